@@ -1,0 +1,41 @@
+# What all targets of this tree share: the language, the warnings, the sanitizers and where the outputs go.
+
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
+set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+
+find_program(CADREL_CCACHE ccache)
+if(CADREL_CCACHE)
+    set(CMAKE_CXX_COMPILER_LAUNCHER ${CADREL_CCACHE})
+endif()
+
+if(CADREL_SANITIZE)
+    set(sanitizers -fsanitize=address,undefined,float-cast-overflow)
+    add_compile_options(${sanitizers} -fno-sanitize-recover=all -fno-omit-frame-pointer)
+    add_compile_definitions(_GLIBCXX_ASSERTIONS)
+    add_link_options(${sanitizers})
+endif()
+if(CADREL_BUILD_FUZZERS)
+    add_compile_options(-fsanitize=fuzzer-no-link)
+endif()
+
+function(cadrel_warnings target)
+    target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Werror)
+endfunction()
+
+# cadrel_library(name FOLDER folder... [LINK library...]): a static library of all sources of the folders.
+function(cadrel_library target)
+    cmake_parse_arguments(PARSE_ARGV 1 ARG "" "" "FOLDER;LINK")
+    set(sources)
+    foreach(folder IN LISTS ARG_FOLDER)
+        file(GLOB found CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/${folder}/*.cpp ${PROJECT_SOURCE_DIR}/${folder}/*.h)
+        list(APPEND sources ${found})
+    endforeach()
+    add_library(${target} STATIC ${sources})
+    target_include_directories(${target} PUBLIC ${PROJECT_SOURCE_DIR}/src)
+    target_link_libraries(${target} PUBLIC ${ARG_LINK})
+    cadrel_warnings(${target})
+endfunction()

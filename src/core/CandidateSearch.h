@@ -1,0 +1,47 @@
+#pragma once
+
+#include "core/ChangeCandidate.h"
+#include "core/EventList.h"
+#include "core/Framerate.h"
+#include "core/MaterialIndex.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace cadrel::core {
+
+class EventBase;
+
+/// Finds, for one new event after the other, the stretches of old programme that show the same material, and decides
+/// between those that claim the same source.
+///
+///     source        |------------ new event ------------|
+///     old events       |---- A ----|  |--- B ---|
+///     candidates       |---- A ----|  |--- B ---|           of overlapping ones, one survives
+class CandidateSearch {
+public:
+    explicit CandidateSearch(const Framerate& framerate) : framerate_(framerate) {}
+
+    /// Adds a valid event of the old list, in the order of the list, under the name that it is compared by.
+    void addOldEvent(const std::string& name, const EventBase& event);
+    /// To be called when all are added, before the first search.
+    void finish() { index_.finish(); }
+
+    /// The candidates that survive for a valid new event, in the order of the old events. `lastDisplacement` is that of
+    /// the previous placement, in seconds: of candidates of one length, that which keeps nearest to it survives. Throws
+    /// Result::OutOfRange when a candidate, also one that wouldn't survive, leaves the day.
+    std::vector<ChangeCandidate> survivingCandidates(const std::string& name, const EventBase& newEvent,
+                                                     double lastDisplacement) const;
+
+private:
+    struct SharedStretch;
+    struct Survivor;
+    class NewEventSearch;
+
+    Framerate framerate_;
+    MaterialIndex index_;
+    std::size_t oldEventCount_ = 0;
+};
+
+} // namespace cadrel::core

@@ -1,0 +1,47 @@
+#include "core/EventBase.h"
+#include "core/EventList.h"
+#include "core/Settings.h"
+#include "core/VfxNameMatcher.h"
+
+namespace cadrel::core {
+
+namespace {
+
+/// Gives each event the flag that `isVfx` has for it; whether any event changed.
+template <class Predicate>
+bool setVfxFlags(const std::vector<std::shared_ptr<EventBase>>& events, Predicate isVfx)
+{
+    bool changed = false;
+    for (const std::shared_ptr<EventBase>& event : events) {
+        const bool flag = isVfx(*event);
+        if (flag == event->vfx())
+            continue;
+        event->setVfx(flag);
+        changed = true;
+    }
+    return changed;
+}
+
+} // namespace
+
+void EventList::markVfx(const VfxNameMatcher& patterns, std::int32_t matchBy)
+{
+    stopListening();
+    const bool changed = setVfxFlags(events_, [&](const EventBase& event) {
+        return patterns.hasVersion(matchBy == MatchBy::ClipName ? event.clipName() : event.rollName());
+    });
+    listen();
+    if (changed)
+        notifyListeners();
+}
+
+void EventList::clearVfx()
+{
+    stopListening();
+    const bool changed = setVfxFlags(events_, [](const EventBase&) { return false; });
+    listen();
+    if (changed)
+        notifyListeners();
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,16 @@
+#pragma once
+
+#include "core/Framerate.h"
+
+namespace cadrel::core {
+
+/// Whoever knows the project's frame rate; see Timecode::setFramerateProvider.
+class FramerateProvider {
+public:
+    virtual Framerate getFramerate() const = 0;
+
+protected:
+    ~FramerateProvider() = default;
+};
+
+} // namespace cadrel::core

@@ -1,0 +1,268 @@
+#include "core/fileio/CmxParser.h"
+
+#include "core/EventBase.h"
+#include "core/EventList.h"
+#include "core/fileio/EventLine.h"
+#include "core/fileio/LineReader.h"
+#include "util/FilePath.h"
+#include "util/StringUtil.h"
+
+#include <algorithm>
+#include <limits>
+#include <memory>
+#include <utility>
+#include <vector>
+
+namespace cadrel::core::fileio {
+
+using util::Result;
+using util::StringUtil;
+
+namespace {
+
+constexpr std::string_view ClipNameKey = "NAME:";
+
+bool isDigit(char character)
+{
+    return character >= '0' && character <= '9';
+}
+
+bool isRollNameCharacter(char character)
+{
+    return isDigit(character) || (character >= 'a' && character <= 'z') || (character >= 'A' && character <= 'Z') ||
+           character == '.' || character == '-' || character == '_';
+}
+
+bool contains(std::string_view text, std::string_view part)
+{
+    return text.find(part) != std::string_view::npos;
+}
+
+/// The value of a text of digits, as large as the field can hold; nothing for any other text.
+template <class Number>
+std::optional<Number> parseNumber(std::string_view text)
+{
+    constexpr auto Greatest = static_cast<std::uint64_t>(std::numeric_limits<Number>::max());
+    std::uint64_t value = 0;
+    for (const char character : text) {
+        if (!isDigit(character))
+            return std::nullopt;
+        value = std::min(value * 10 + static_cast<std::uint64_t>(character - '0'), Greatest);
+    }
+    return static_cast<Number>(value);
+}
+
+/// An event that comment lines may still follow. Its comment is set when they all are there, so that it takes no more
+/// memory than it needs.
+struct OpenEvent {
+    std::shared_ptr<EventBase> event = std::make_shared<EventBase>();
+    std::string comment;
+
+    void applyComment(std::string_view line)
+    {
+        const std::size_t key = line.find(ClipNameKey);
+        if (key != std::string_view::npos) {
+            const std::string_view name = StringUtil::trimView(line.substr(key + ClipNameKey.size()));
+            if (name.empty())
+                return;
+            event->setClipName(std::string(name));
+        }
+        comment += '\n';
+        comment += line;
+    }
+};
+
+/// Collects the events of a file in their order and gives them their comment lines. Of two lines with one number, as a
+/// transition has them, the comments name the clip of the first line by FROM CLIP and that of the second by TO CLIP.
+class EventCollector {
+public:
+    /// The event that the next line is read into.
+    EventBase& begin()
+    {
+        if (isPending_) {
+            close(previous_);
+            std::swap(previous_, current_);
+            events_.push_back(previous_.event);
+        }
+        current_.event = std::make_shared<EventBase>();
+        isPending_ = false;
+        return *current_.event;
+    }
+
+    /// Takes the event that was begun into the list.
+    void accept(std::string_view line)
+    {
+        current_.comment = line;
+        isPending_ = true;
+    }
+
+    void addComment(std::string_view line)
+    {
+        if (!isPending_)
+            return;
+        if (previous_.event->eventNumber() != current_.event->eventNumber())
+            current_.applyComment(line);
+        else if (contains(line, "FROM CLIP"))
+            previous_.applyComment(line);
+        else if (contains(line, "TO CLIP"))
+            current_.applyComment(line);
+    }
+
+    /// All events of the file, which has ended.
+    std::vector<std::shared_ptr<EventBase>> end()
+    {
+        close(previous_);
+        if (isPending_) {
+            close(current_);
+            events_.push_back(current_.event);
+        }
+        return std::move(events_);
+    }
+
+private:
+    static void close(const OpenEvent& open) { open.event->setComment(open.comment); }
+
+    // The first event of a file has no previous one; an event outside the list, of number 0, stands in for it.
+    OpenEvent previous_;
+    OpenEvent current_;
+    bool isPending_ = false;
+    std::vector<std::shared_ptr<EventBase>> events_;
+};
+
+} // namespace
+
+Result::Type CmxParser::parse(const std::wstring& path, EventList& events, Framerate& framerate, bool acceptAudio)
+try {
+    const std::string fileName = StringUtil::toUtf8(StringUtil::fileNameOf(path));
+    EventCollector collector;
+    readLines(
+        path,
+        [&](std::string_view line) {
+            EventBase& event = collector.begin();
+            event.setEdlFileName(fileName);
+            if (parseEventLine(line, acceptAudio, event))
+                collector.accept(line);
+        },
+        [&](std::string_view line) { collector.addComment(line); });
+    events.append(collector.end());
+    framerate = detectedFramerate();
+    return Result::Ok;
+} catch (Result::Type failure) {
+    return failure;
+}
+
+Result::Type CmxParser::detect(const std::wstring& path, Framerate& framerate)
+try {
+    readLines(
+        path,
+        [&](std::string_view line) {
+            const EventLine columns(line);
+            for (std::size_t index = 0; index < columns.timecodeCount; ++index)
+                parseTimecode(columns.timecodes[index]);
+        },
+        [](std::string_view) {});
+    framerate = detectedFramerate();
+    return Result::Ok;
+} catch (Result::Type failure) {
+    return failure;
+}
+
+Framerate CmxParser::detectedFramerate() const
+{
+    if (dropFrameState_ == 1)
+        return {30, 1};
+    std::size_t highest = frameHistogram_.size() - 1;
+    while (highest > 0 && frameHistogram_[highest] == 0)
+        --highest;
+    if (highest == 0)
+        return {0, dropFrameState_};
+    for (const std::int32_t rate : {24, 25, 30}) {
+        if (highest < static_cast<std::size_t>(rate))
+            return {rate, dropFrameState_};
+    }
+    return {60, dropFrameState_};
+}
+
+/// Calls one of the two for each event line and each comment line, and looks at the frame-count mode.
+template <class EventLineAction, class CommentAction>
+void CmxParser::readLines(const std::wstring& path, EventLineAction onEventLine, CommentAction onComment)
+{
+    LineReader reader(util::toFilePath(path));
+    dropFrameState_ = -1;
+    while (const std::optional<std::string_view> line = reader.next()) {
+        if (line->empty())
+            continue;
+        if (line->starts_with("FCM"))
+            readFrameCountMode(*line);
+        else if (isDigit(line->front()))
+            onEventLine(*line);
+        else if (line->front() == '*')
+            onComment(*line);
+    }
+}
+
+void CmxParser::readFrameCountMode(std::string_view line)
+{
+    if (contains(line, "NON-DROP FRAME"))
+        dropFrameState_ = 0;
+    else if (contains(line, "DROP FRAME"))
+        dropFrameState_ = 1;
+}
+
+/// False for a line that makes no event, for want of columns or of a provider for the timecodes.
+bool CmxParser::parseEventLine(std::string_view line, bool acceptAudio, EventBase& event)
+try {
+    using Setter = void (EventBase::*)(const Timecode&);
+    static constexpr std::array<Setter, 4> Setters{&EventBase::setSrcIn, &EventBase::setSrcOut, &EventBase::setDstIn,
+                                                   &EventBase::setDstOut};
+    const EventLine columns(line);
+
+    if (const auto number = parseNumber<std::uint32_t>(columns.number))
+        event.setEventNumber(*number);
+    else
+        event.addFlaw(EventFlaw::EventNumberNotNumeric);
+
+    if (std::all_of(columns.rollName.begin(), columns.rollName.end(), isRollNameCharacter))
+        event.setRollName(std::string(columns.rollName));
+    else
+        event.addFlaw(EventFlaw::RollNameInvalid);
+
+    if (columns.channel.find_first_of(acceptAudio ? "ABV" : "BV") == std::string_view::npos)
+        event.addFlaw(EventFlaw::NotVideoEvent);
+
+    if (columns.transitionType)
+        event.setTransitionType(*columns.transitionType);
+    else
+        event.addFlaw(EventFlaw::TransitionTypeUnsupported);
+
+    if (columns.duration) {
+        if (const auto duration = parseNumber<std::int32_t>(*columns.duration))
+            event.setTransitionDuration(*duration);
+        else
+            event.addFlaw(EventFlaw::TransitionDurationInvalid);
+    }
+
+    for (std::size_t index = 0; index < columns.timecodeCount; ++index) {
+        if (const std::optional<Timecode> timecode = parseTimecode(columns.timecodes[index]))
+            (event.*Setters[index])(*timecode);
+        else
+            event.addFlaw(EventFlaw::SrcInUnreadable + static_cast<std::int32_t>(index));
+    }
+    return columns.isComplete();
+} catch (Result::Type) {
+    return false;
+}
+
+/// Also counts the timecode for the frame rate.
+std::optional<Timecode> CmxParser::parseTimecode(std::string_view column)
+{
+    const std::optional<Timecode> timecode = Timecode::parse(column);
+    if (timecode) {
+        const auto frames = static_cast<std::size_t>(timecode->frames());
+        if (frames < frameHistogram_.size() && frameHistogram_[frames] < std::numeric_limits<std::int32_t>::max())
+            ++frameHistogram_[frames];
+    }
+    return timecode;
+}
+
+} // namespace cadrel::core::fileio

@@ -1,0 +1,56 @@
+#pragma once
+
+#include "core/Timecode.h"
+#include "core/fileio/ParserInterface.h"
+
+#include <array>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace cadrel::core {
+class EventBase;
+}
+
+namespace cadrel::core::fileio {
+
+/// Reads CMX EDLs. It is forgiving about the file and strict about each field: a line that is neither an event nor a
+/// comment is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. Only an event
+/// line with too few columns disappears.
+///
+///     FCM: NON-DROP FRAME
+///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
+///     * FROM CLIP NAME: SC12_TK3
+///     002  A001C003 V     C        10:00:04:00 10:00:04:00 01:00:04:00 01:00:04:00      a dissolve in two lines
+///     002  A002C001 V     D    024 11:00:00:00 11:00:03:00 01:00:04:00 01:00:07:00      with one number
+///     * FROM CLIP NAME: SC12_TK3
+///     * TO CLIP NAME: SC14_TK1
+///
+/// Lines end with CR where a CR comes before the first LF, else with LF.
+class CmxParser : public ParserInterface {
+public:
+    using ParserInterface::parse;
+    util::Result::Type parse(const std::wstring& path, EventList& events, Framerate& framerate,
+                             bool acceptAudio) override;
+
+    /// Reads the file for its rate alone: `framerate` becomes what `parse` would give. Returns as `parse`.
+    util::Result::Type detect(const std::wstring& path, Framerate& framerate);
+
+    /// The rate by what has been read: drop-frame 30 where the last parsed file says drop-frame, else the least nominal
+    /// rate that holds the highest frames field below 60 that this parser has seen, with the drop-frame state of the
+    /// last file's "FCM" lines. Unknown when nothing shows it. Pulled-down rates are never detected.
+    Framerate detectedFramerate() const;
+
+private:
+    template <class EventLineAction, class CommentAction>
+    void readLines(const std::wstring& path, EventLineAction onEventLine, CommentAction onComment);
+    void readFrameCountMode(std::string_view line);
+    bool parseEventLine(std::string_view line, bool acceptAudio, EventBase& event);
+    std::optional<Timecode> parseTimecode(std::string_view column);
+
+    std::int32_t dropFrameState_ = -1; ///< 0 non-drop, 1 drop-frame
+    std::array<std::int32_t, 60> frameHistogram_{};
+};
+
+} // namespace cadrel::core::fileio

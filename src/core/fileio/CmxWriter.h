@@ -1,0 +1,34 @@
+#pragma once
+
+#include "core/fileio/WriterInterface.h"
+
+#include <cstddef>
+#include <string>
+
+namespace cadrel::core::fileio {
+
+/// Writes CMX EDLs of cuts: a title line, then a line for each valid event, numbered by its position in the list. No
+/// comments, clip names, durations or frame-count mode are written.
+///
+///     TITLE:   reel3_change.edl
+///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
+///
+/// A list of more than 999 events goes into several files, "name_1.edl", "name_2.edl" and so on, each numbered from 1.
+/// A file is written beside its target and takes its place when all is written, so that a failure leaves what stood
+/// there; a target that is no regular file is written directly.
+class CmxWriter : public WriterInterface {
+public:
+    /// What the three-digit column of event numbers can hold.
+    static constexpr std::size_t MostEventsInAFile = 999;
+
+    /// Returns InvalidArgument for an empty list and for one without a readable event, FileAccessFailed when the file
+    /// can't be opened or written, NotAvailable when it could be but has an empty last component, or what is thrown
+    /// while writing.
+    util::Result::Type write(const std::wstring& path, const EventList& events) override;
+
+    /// A roll name as the file's eight columns take it: capitals, digits and ".-_", and "SHOT_-12" for
+    /// "SHOT_LONGNAME_12".
+    static std::string normalizedRollName(const std::string& name);
+};
+
+} // namespace cadrel::core::fileio

@@ -1,0 +1,35 @@
+#pragma once
+
+#include <cstddef>
+#include <filesystem>
+#include <fstream>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace cadrel::core::fileio {
+
+/// Reads the lines of a file of 8-bit text one by one, holding no more of the file than a chunk or its longest line.
+/// All lines end with CR when a CR comes before the first LF, else with LF, so that of CR LF the LF opens the next line.
+class LineReader {
+public:
+    /// Throws Result::FileAccessFailed for what isn't a regular file or can't be read. Never waits for a pipe.
+    explicit LineReader(const std::filesystem::path& file);
+
+    /// The next line without blanks, tabs, LF and CR at its ends, valid until the next call; nothing at the end of the
+    /// file. Throws Result::FileAccessFailed when the reading breaks off.
+    std::optional<std::string_view> next();
+
+private:
+    void findDelimiter();
+    bool readMore();
+    std::string_view unread() const { return std::string_view(buffer_).substr(begin_, end_ - begin_); }
+
+    std::ifstream stream_;
+    std::string buffer_;
+    std::size_t begin_ = 0; ///< what has been read from the file and not given out stands from here
+    std::size_t end_ = 0;   ///< to here
+    char delimiter_ = '\n';
+};
+
+} // namespace cadrel::core::fileio

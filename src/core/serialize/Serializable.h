@@ -1,0 +1,42 @@
+#pragma once
+
+#include <cstdint>
+
+namespace cadrel::core::serialize {
+
+class ByteArchive;
+
+/// An object that knows its persisted form, framed by the version number of its class, so that each object of a stream
+/// can be read by code that is newer than its writer.
+class Serializable {
+public:
+    virtual ~Serializable() = default;
+
+    /// Reads a body of the running code's version.
+    virtual void readCurrent(ByteArchive& archive) = 0;
+    /// Appends the body in the running code's version.
+    virtual void write(ByteArchive& archive) const = 0;
+    /// Reads a body of an older version; the default throws Result::NotSupported. Throws Result::UnknownVersion for a
+    /// version that the class doesn't handle.
+    virtual void readOlder(ByteArchive& archive, std::uint32_t version);
+
+    /// Appends the version number and the body.
+    void serialize(ByteArchive& archive) const;
+    /// Reads the version number and the body in that version. Throws Result::NewerVersion when the stream's version is
+    /// greater than the code's.
+    void deserialize(ByteArchive& archive);
+
+    /// The version that the running code writes; reading doesn't change it.
+    std::uint32_t version() const { return version_; }
+
+protected:
+    explicit Serializable(std::uint32_t version) : version_(version) {}
+    Serializable(const Serializable&) = default;
+    /// The version belongs to the class, not to the value.
+    Serializable& operator=(const Serializable&) { return *this; }
+
+private:
+    std::uint32_t version_;
+};
+
+} // namespace cadrel::core::serialize

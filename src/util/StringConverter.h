@@ -1,0 +1,19 @@
+#pragma once
+
+#include "util/StringUtil.h"
+
+namespace cadrel::util {
+
+/// The conversions between UTF-8 and wide text; translation is left to whoever knows the user's language.
+class StringConverter : public StringUtil::StringConverterInterface {
+public:
+    /// Throws Result::InvalidArgument for a unit that is no Unicode character.
+    std::string toUtf8(const std::wstring& text) const override;
+    /// Throws Result::InvalidArgument for bytes that are no UTF-8.
+    std::wstring toWide(const std::string& text) const override;
+
+protected:
+    ~StringConverter() = default;
+};
+
+} // namespace cadrel::util
