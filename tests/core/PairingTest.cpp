@@ -1,0 +1,556 @@
+#include "core/ChangeEdlGenerator.h"
+#include "core/EventBase.h"
+#include "core/EventList.h"
+#include "core/Settings.h"
+#include "core/Timecode.h"
+#include "tests/core/EventMaking.h"
+#include "tests/core/PairwiseGenerator.h"
+#include "tests/core/TestProject.h"
+#include "util/Result.h"
+
+#include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
+
+#include <algorithm>
+#include <array>
+#include <cstddef>
+#include <cstdint>
+#include <ctime>
+#include <memory>
+#include <ostream>
+#include <sstream>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace cadrel::tests {
+namespace {
+
+using core::ChangeEdlGenerator;
+using core::EventBase;
+using core::EventList;
+using core::Framerate;
+using core::MatchBy;
+using core::Timecode;
+using core::TransitionType;
+using core::VfxPatternEntry;
+using util::Result;
+
+/// A whole number as a stack of choices, the first of which is the simplest. Shrinking the number towards zero makes
+/// one choice after the other simple.
+class Choices {
+public:
+    explicit Choices(std::uint64_t number) : number_(number) {}
+
+    int below(int count)
+    {
+        const auto divisor = static_cast<std::uint64_t>(count);
+        const auto choice = static_cast<int>(number_ % divisor);
+        number_ /= divisor;
+        return choice;
+    }
+    template <typename T, std::size_t N>
+    const T& oneOf(const T (&values)[N])
+    {
+        return values[static_cast<std::size_t>(below(static_cast<int>(N)))];
+    }
+
+private:
+    std::uint64_t number_;
+};
+
+/// What a random film is made from: a number for its setting and one for each event.
+struct FilmSeed {
+    std::uint64_t setting = 0;
+    std::vector<std::uint64_t> oldEvents;
+    std::vector<std::uint64_t> newEvents;
+};
+
+std::ostream& operator<<(std::ostream& out, const FilmSeed& seed)
+{
+    return out << seed.setting << ", " << seed.oldEvents.size() << " old and " << seed.newEvents.size()
+               << " new events";
+}
+
+/// What an event is, without its place in the programme. Lengths and places are in frames.
+struct Shot {
+    std::string roll;
+    std::string clip;
+    int srcIn = 0;
+    int srcLength = 0;
+    int dstLength = 0;
+    int transitionType = TransitionType::Cut;
+    int transitionDuration = 0;
+    bool sharesNumber = false;
+};
+
+enum class Damage { None, SrcReversed, DstReversed, SrcOutOfRate, DstInOutOfRate, Unreadable, Uninitialized };
+
+enum class Speeds { Normal, Odd, Freezes };
+
+/// A pair of small EDLs in which everything happens often that is rare in a reel: the same material in many places,
+/// nested and chained source ranges, ties, transitions longer than their event, odd speeds, flaws.
+class Film {
+public:
+    explicit Film(const FilmSeed& seed) : setting_(seed.setting)
+    {
+        framerate = setting_.oneOf(
+            {Framerate(25, 0), Framerate(24, 0), Framerate(30, 1), Framerate(30, true, 1), Framerate(24, true, 0)});
+        matchBy = setting_.oneOf<int>({MatchBy::RollName, MatchBy::ClipName, MatchBy::RollName});
+        nameCount_ = setting_.oneOf({1, 2, 1, 4, 0});
+        vfxRows = setting_.oneOf(VfxRows);
+        grid_ = setting_.oneOf({10, 25, 1, 4});
+        placeCount_ = setting_.oneOf({3, 12, 1, 40});
+        const int nearTheEnd = framerate.lastFrame - 400;
+        srcBase_ = setting_.oneOf({0, 90000, 0, 90000, 0, 90000, 0, nearTheEnd});
+        dstBase_ = setting_.oneOf({0, 90000, 0, 90000, 0, 90000, 0, nearTheEnd});
+        hasMaterialInARow_ = setting_.below(3) == 1;
+        hasOnlyCuts_ = setting_.below(3) == 0;
+        speeds_ = setting_.oneOf({Speeds::Normal, Speeds::Odd, Speeds::Normal, Speeds::Freezes});
+        hasTrims_ = setting_.below(3) == 1;
+        hasDamage_ = setting_.below(4) == 1;
+        hasBadDurations_ = setting_.below(16) == 1;
+        order_ = setting_.below(4);
+        copyShift_ = setting_.below(3);
+
+        const TestProject project(framerate);
+        std::vector<Shot> oldShots;
+        int sourceEnd = srcBase_;
+        for (const std::uint64_t number : seed.oldEvents) {
+            Choices choices(number);
+            Shot shot = newShot(choices);
+            if (hasMaterialInARow_) {
+                shot.srcIn = std::max(srcBase_, sourceEnd + choices.oneOf({0, -3, 5}));
+                sourceEnd = shot.srcIn + shot.srcLength;
+            }
+            oldShots.push_back(shot);
+            place(oldShots.back(), choices, oldEvents);
+        }
+        programmeEnd_ = 0;
+        lastIn_ = 0;
+        for (std::size_t i = 0; i < seed.newEvents.size(); ++i) {
+            Choices choices(seed.newEvents[i]);
+            const bool isNew = choices.below(3) == 0 || oldShots.empty();
+            Shot shot = isNew ? newShot(choices) : oldShots[(i + copyShift_) % oldShots.size()];
+            if (!isNew && hasTrims_)
+                trim(shot, choices);
+            place(shot, choices, newEvents);
+        }
+    }
+
+    Framerate framerate;
+    int matchBy;
+    std::vector<VfxPatternEntry> vfxRows;
+    EventList oldEvents;
+    EventList newEvents;
+
+private:
+    static const std::vector<VfxPatternEntry> VfxRows[4];
+
+    std::string newName(Choices& choices)
+    {
+        if (nameCount_ == 0)
+            return {};
+        const std::string letter(1, static_cast<char>('A' + choices.below(nameCount_)));
+        if (vfxRows.empty())
+            return letter;
+        const std::string version = std::to_string(choices.below(3));
+        return choices.oneOf<std::string>(
+            {"SHOT_" + letter + "_V" + version + "_COMP", letter, "VFX_" + version, "SHOT_" + letter + "_V_COMP"});
+    }
+
+    Shot newShot(Choices& choices)
+    {
+        Shot shot;
+        shot.roll = newName(choices);
+        shot.clip = newName(choices);
+        shot.srcIn = srcBase_ + grid_ * choices.below(placeCount_);
+        shot.srcLength = choices.oneOf({10, 20, 24, 100, 50, 51, 1, 2, 3, 5, 0, 101, 200});
+        shot.dstLength = shot.srcLength;
+        if (speeds_ == Speeds::Odd)
+            shot.dstLength = oddLength(shot.srcLength, choices);
+        if (speeds_ == Speeds::Freezes)
+            shot.dstLength = choices.oneOf({150, 101, 400}) * shot.srcLength;
+        if (!hasOnlyCuts_)
+            shot.transitionType =
+                choices.oneOf<int>({TransitionType::Cut, TransitionType::Dissolve, TransitionType::Cut,
+                                    TransitionType::Wipe, TransitionType::Cut, TransitionType::Dissolve, 3});
+        if (shot.transitionType != TransitionType::Cut || choices.below(32) == 1)
+            shot.transitionDuration = choices.oneOf({4, 8, 1, 0, 12, 60, 250});
+        if (hasBadDurations_ && choices.below(8) == 1)
+            shot.transitionDuration = choices.oneOf({-1, 5000000, 2000000});
+        shot.sharesNumber = choices.below(2) == 1;
+        return shot;
+    }
+
+    /// The length in the programme of a shot that is slow, fast or frozen, or nearly at normal speed.
+    static int oddLength(int length, Choices& choices)
+    {
+        return choices.oneOf({length, 2 * length, length / 2, length + 1, std::max(0, length - 1), 200 * length,
+                              100 * length, 50 * length, length / 50, 99 * length / 100, 100, 10, 0});
+    }
+
+    /// The picture editor's changes of a shot that stays.
+    static void trim(Shot& shot, Choices& choices)
+    {
+        const int frames = choices.oneOf({0, 1, 0, 3, 6});
+        const bool isAtHead = choices.below(2) == 1;
+        if (isAtHead)
+            shot.srcIn += frames;
+        shot.srcLength = std::max(0, shot.srcLength - frames);
+        shot.dstLength = std::max(0, shot.dstLength - frames);
+        if (choices.below(8) == 1)
+            shot.transitionDuration += 1;
+        if (choices.below(8) == 1)
+            shot.dstLength += 1;
+    }
+
+    void place(const Shot& shot, Choices& choices, EventList& list)
+    {
+        const int gap = choices.oneOf({0, 0, 0, 1, 7, -4});
+        const bool coversThePrevious = choices.below(8) == 1;
+        const int dstIn = coversThePrevious ? lastIn_ : std::max(0, programmeEnd_ + gap);
+        const auto damage = hasDamage_
+                                ? choices.oneOf({Damage::None, Damage::None, Damage::None, Damage::None, Damage::None,
+                                                 Damage::SrcReversed, Damage::DstReversed, Damage::SrcOutOfRate,
+                                                 Damage::DstInOutOfRate, Damage::Unreadable, Damage::Uninitialized})
+                                : Damage::None;
+        lastIn_ = dstIn;
+        programmeEnd_ = dstIn + shot.dstLength;
+
+        const auto event = std::make_shared<EventBase>();
+        event->setRollName(shot.roll);
+        event->setClipName(shot.clip);
+        event->setTransitionType(shot.transitionType);
+        event->setTransitionDuration(shot.transitionDuration);
+        setTimes(*event, damage, inDay(shot.srcIn), inDay(shot.srcIn + shot.srcLength), inDay(dstBase_ + dstIn),
+                 inDay(dstBase_ + programmeEnd_));
+        const auto number = static_cast<std::uint32_t>(list.size());
+        event->setEventNumber(shot.sharesNumber && number > 0 ? list.at(number - 1).eventNumber() : number + 1);
+        addInOrder(event, list);
+    }
+
+    Timecode inDay(int frame) const { return Timecode(std::min(frame, framerate.lastFrame)); }
+
+    static void setTimes(EventBase& event, Damage damage, Timecode srcIn, Timecode srcOut, Timecode dstIn,
+                         Timecode dstOut)
+    {
+        if (damage == Damage::SrcReversed)
+            std::swap(srcIn, srcOut);
+        if (damage == Damage::DstReversed)
+            std::swap(dstIn, dstOut);
+        if (damage == Damage::SrcOutOfRate)
+            srcOut.set(srcOut.hours(), srcOut.minutes(), srcOut.seconds(), 30);
+        if (damage == Damage::DstInOutOfRate)
+            dstIn.set(dstIn.hours(), dstIn.minutes(), dstIn.seconds(), 31);
+        if (damage == Damage::Unreadable)
+            event.addFlaw(core::EventFlaw::NotVideoEvent);
+        event.setSrc(srcIn, srcOut);
+        if (damage != Damage::Uninitialized)
+            event.setDst(dstIn, dstOut);
+    }
+
+    void addInOrder(const std::shared_ptr<EventBase>& event, EventList& list) const
+    {
+        const bool comesFirst = order_ == 1 || (order_ == 2 && list.size() % 3 == 2);
+        if (!comesFirst) {
+            list.add(event);
+            return;
+        }
+        EventList others = list;
+        list.clear();
+        list.add(event);
+        list.append(others);
+    }
+
+    Choices setting_;
+    int nameCount_;
+    int grid_;
+    int placeCount_;
+    int srcBase_;
+    int dstBase_;
+    bool hasMaterialInARow_;
+    bool hasOnlyCuts_;
+    Speeds speeds_;
+    bool hasTrims_;
+    bool hasDamage_;
+    bool hasBadDurations_;
+    int order_;
+    std::size_t copyShift_;
+    int programmeEnd_ = 0;
+    int lastIn_ = 0;
+};
+
+const std::vector<VfxPatternEntry> Film::VfxRows[4] = {
+    {},
+    {VfxPatternEntry("SHOT_*_V", "_COMP", true)},
+    {VfxPatternEntry("", "", true), VfxPatternEntry("VFX_", "", true), VfxPatternEntry("SHOT_A_V", "_COMP", false)},
+    {},
+};
+
+/// Every field of every event, a line each.
+std::string textOf(const EventList& list)
+{
+    std::ostringstream text;
+    for (const auto& event : list.events()) {
+        text << event->eventNumber() << " [" << event->rollName() << "] [" << event->clipName() << "] "
+             << event->transitionType() << "/" << event->transitionDuration() << " " << event->srcIn().toString() << " "
+             << event->srcOut().toString() << " " << event->dstIn().toString() << " " << event->dstOut().toString()
+             << " x" << event->motionSpeed() << (event->vfx() ? " vfx" : "") << (event->isValid() ? "" : " invalid")
+             << " kind " << event->eventKind() << " [" << event->edlFileName() << event->comment() << "]\n";
+    }
+    return text.str();
+}
+
+/// The change list as text, or the result that was thrown.
+template <typename Generator>
+std::string outcomeOf(const Generator& generator, const Film& film)
+{
+    EventList changeEvents;
+    try {
+        generator.generate(film.oldEvents, film.newEvents, changeEvents);
+    } catch (Result::Type result) {
+        return "throws " + std::to_string(result);
+    }
+    return textOf(changeEvents);
+}
+
+std::string outcomeOfThePairwise(const Film& film)
+{
+    return outcomeOf(PairwiseGenerator(film.matchBy, film.vfxRows), film);
+}
+
+std::string outcomeOfTheGenerator(const Film& film)
+{
+    ChangeEdlGenerator generator;
+    generator.configure(film.matchBy, film.vfxRows);
+    return outcomeOf(generator, film);
+}
+
+rc::Gen<FilmSeed> anyFilm(int largestList)
+{
+    const auto number = rc::gen::resize(rc::kNominalSize, rc::gen::arbitrary<std::uint64_t>());
+    const auto numbers = rc::gen::resize(largestList, rc::gen::container<std::vector<std::uint64_t>>(number));
+    return rc::gen::build<FilmSeed>(rc::gen::set(&FilmSeed::setting, number),
+                                    rc::gen::set(&FilmSeed::oldEvents, numbers),
+                                    rc::gen::set(&FilmSeed::newEvents, numbers));
+}
+
+void checkFilm(const FilmSeed& seed)
+{
+    const Film film(seed);
+    const TestProject project(film.framerate);
+    const std::string oldBefore = textOf(film.oldEvents);
+    const std::string newBefore = textOf(film.newEvents);
+    const std::string expected = outcomeOfThePairwise(film);
+
+    const std::string found = outcomeOfTheGenerator(film);
+
+    if (found != expected)
+        RC_FAIL("at " + std::to_string(film.framerate.rate) + " fps, matching " + std::to_string(film.matchBy) +
+                "\nold\n" + oldBefore + "new\n" + newBefore + "pairwise\n" + expected + "generated\n" + found);
+    RC_ASSERT(textOf(film.oldEvents) == oldBefore);
+    RC_ASSERT(textOf(film.newEvents) == newBefore);
+}
+
+} // namespace
+
+RC_GTEST_PROP(Pairing, SmallFilmsGiveWhatPairingOneByOneGives, ())
+{
+    for (const FilmSeed& seed : *rc::gen::container<std::vector<FilmSeed>>(100, anyFilm(24)))
+        checkFilm(seed);
+}
+
+RC_GTEST_PROP(Pairing, LargerFilmsGiveWhatPairingOneByOneGives, ())
+{
+    checkFilm(*anyFilm(80));
+}
+
+namespace {
+
+#if defined(__SANITIZE_ADDRESS__)
+constexpr bool IsSanitized = true;
+#elif defined(__has_feature)
+constexpr bool IsSanitized = __has_feature(address_sanitizer);
+#else
+constexpr bool IsSanitized = false;
+#endif
+#ifdef NDEBUG
+constexpr bool IsOptimized = true;
+#else
+constexpr bool IsOptimized = false;
+#endif
+
+constexpr double AmpleSeconds = IsSanitized ? 60.0 : IsOptimized ? 2.0 : 10.0;
+constexpr int ManyEvents = 20000;
+constexpr int ShotLength = 100;
+
+std::shared_ptr<EventBase> makeShot(int srcIn, int dstIn, int length)
+{
+    const auto event = std::make_shared<EventBase>();
+    event->setRollName("ONE_NAME");
+    event->setTimecodes(Timecode(srcIn), Timecode(srcIn + length), Timecode(dstIn), Timecode(dstIn + length));
+    return event;
+}
+
+/// A list of shots of one length, each from where in its source `srcInOf` says, in a row in the programme.
+template <typename SrcInOf>
+EventList rowOfShots(int count, SrcInOf srcInOf)
+{
+    EventList list;
+    for (int i = 0; i < count; ++i)
+        list.add(makeShot(srcInOf(i), i * ShotLength, ShotLength));
+    return list;
+}
+
+/// Generates within a time that is ample for work close to n log n, and far too short for pairing one by one.
+EventList generatedInTime(const EventList& oldEvents, const EventList& newEvents)
+{
+    EventList changeEvents;
+    const std::clock_t start = std::clock();
+    ChangeEdlGenerator().generate(oldEvents, newEvents, changeEvents);
+    EXPECT_LT(static_cast<double>(std::clock() - start) / CLOCKS_PER_SEC, AmpleSeconds);
+    return changeEvents;
+}
+
+/// Expects an event of one shot's length that carries the material at `oldIn` to `newIn`; quick, for thousands of them.
+void expectChange(const EventBase& event, int number, int oldIn, int newIn)
+{
+    const bool isRight = event.eventNumber() == static_cast<std::uint32_t>(number) &&
+                         event.srcIn() == Timecode(oldIn) && event.srcOut() == Timecode(oldIn + ShotLength) &&
+                         event.dstIn() == Timecode(newIn) && event.dstOut() == Timecode(newIn + ShotLength);
+    ASSERT_TRUE(isRight) << "event " << number << ": from " << oldIn << " to " << newIn << ", but found "
+                         << timecodesOf(event);
+}
+
+} // namespace
+
+TEST(PairingSpeed, DistinctMaterialUnderOneNameIsFoundAtItsPlace)
+{
+    const TestProject project;
+    const EventList oldEvents = rowOfShots(ManyEvents, [](int i) { return i * ShotLength; });
+    const EventList newEvents = rowOfShots(ManyEvents, [](int i) { return (ManyEvents - 1 - i) * ShotLength; });
+
+    const EventList changeEvents = generatedInTime(oldEvents, newEvents);
+
+    ASSERT_EQ(changeEvents.size(), std::size_t{ManyEvents});
+    for (int i = 0; i < ManyEvents; ++i) {
+        const int oldIn = (ManyEvents - 1 - i) * ShotLength;
+        ASSERT_NO_FATAL_FAILURE(
+            expectChange(changeEvents.at(static_cast<std::size_t>(i)), i + 1, oldIn, i * ShotLength));
+    }
+}
+
+//  old programme   |A|B|C| ... |Y|Z|
+//  new programme   |--- A to M ---|N|O| ... |Z|
+TEST(PairingSpeed, ALongNewShotGivesAnEventForEachOldShotInIt)
+{
+    const TestProject project;
+    constexpr int Covered = ManyEvents / 2;
+    const EventList oldEvents = rowOfShots(ManyEvents, [](int i) { return i * ShotLength; });
+    EventList newEvents;
+    newEvents.add(makeShot(0, 0, Covered * ShotLength));
+    for (int i = Covered; i < ManyEvents; ++i)
+        newEvents.add(makeShot(i * ShotLength, i * ShotLength, ShotLength));
+
+    const EventList changeEvents = generatedInTime(oldEvents, newEvents);
+
+    ASSERT_EQ(changeEvents.size(), std::size_t{ManyEvents});
+    for (int i = 0; i < ManyEvents; ++i)
+        ASSERT_NO_FATAL_FAILURE(
+            expectChange(changeEvents.at(static_cast<std::size_t>(i)), i + 1, i * ShotLength, i * ShotLength));
+}
+
+TEST(PairingSpeed, ALongOldShotGivesAnEventForEachNewShotInIt)
+{
+    const TestProject project;
+    constexpr int Covered = ManyEvents / 2;
+    EventList oldEvents;
+    oldEvents.add(makeShot(0, 0, Covered * ShotLength));
+    for (int i = Covered; i < ManyEvents; ++i)
+        oldEvents.add(makeShot(i * ShotLength, i * ShotLength, ShotLength));
+    const EventList newEvents = rowOfShots(ManyEvents, [](int i) { return (ManyEvents - 1 - i) * ShotLength; });
+
+    const EventList changeEvents = generatedInTime(oldEvents, newEvents);
+
+    ASSERT_EQ(changeEvents.size(), std::size_t{ManyEvents});
+    for (int i = 0; i < ManyEvents; ++i) {
+        const int oldIn = (ManyEvents - 1 - i) * ShotLength;
+        ASSERT_NO_FATAL_FAILURE(
+            expectChange(changeEvents.at(static_cast<std::size_t>(i)), i + 1, oldIn, i * ShotLength));
+    }
+}
+
+// Every old place fits every new one; the placement before decides, which starts with no displacement.
+TEST(PairingSpeed, TheSameStretchInManyPlacesStaysWhereItWas)
+{
+    const TestProject project;
+    const EventList oldEvents = rowOfShots(ManyEvents, [](int) { return 0; });
+    const EventList newEvents = rowOfShots(ManyEvents, [](int) { return 0; });
+
+    const EventList changeEvents = generatedInTime(oldEvents, newEvents);
+
+    ASSERT_EQ(changeEvents.size(), std::size_t{ManyEvents});
+    for (int i = 0; i < ManyEvents; ++i)
+        ASSERT_NO_FATAL_FAILURE(
+            expectChange(changeEvents.at(static_cast<std::size_t>(i)), i + 1, i * ShotLength, i * ShotLength));
+}
+
+// The new programme starts seven frames later, so that of all places the first is the nearest to the first; from there
+// on each keeps that displacement.
+TEST(PairingSpeed, TheSameStretchInManyPlacesKeepsItsDisplacement)
+{
+    const TestProject project;
+    constexpr int Offset = 7;
+    const EventList oldEvents = rowOfShots(ManyEvents, [](int) { return 0; });
+    EventList newEvents;
+    for (int i = 0; i < ManyEvents; ++i)
+        newEvents.add(makeShot(0, Offset + i * ShotLength, ShotLength));
+
+    const EventList changeEvents = generatedInTime(oldEvents, newEvents);
+
+    ASSERT_EQ(changeEvents.size(), std::size_t{ManyEvents});
+    for (int i = 0; i < ManyEvents; ++i)
+        ASSERT_NO_FATAL_FAILURE(
+            expectChange(changeEvents.at(static_cast<std::size_t>(i)), i + 1, i * ShotLength, Offset + i * ShotLength));
+}
+
+// A picture editor who changes nothing gets a change list that moves nothing.
+RC_GTEST_PROP(Pairing, IdenticalListsOfPlainCutsAtNormalSpeedMoveNothing, ())
+{
+    struct Cut {
+        int name;
+        int srcIn;
+        int length;
+        int gap;
+    };
+    const auto cuts = *rc::gen::container<std::vector<Cut>>(rc::gen::build<Cut>(
+        rc::gen::set(&Cut::name, rc::gen::inRange(0, 3)), rc::gen::set(&Cut::srcIn, rc::gen::inRange(0, 60)),
+        rc::gen::set(&Cut::length, rc::gen::inRange(1, 40)), rc::gen::set(&Cut::gap, rc::gen::inRange(0, 5))));
+    const TestProject project(*rc::gen::element(Framerate(25, 0), Framerate(24, true, 0), Framerate(30, true, 1)));
+    EventList programme;
+    int end = 0;
+    for (const Cut& cut : cuts) {
+        const auto event = makeShot(cut.srcIn, end + cut.gap, cut.length);
+        event->setRollName("ROLL" + std::to_string(cut.name));
+        programme.add(event);
+        end += cut.gap + cut.length;
+    }
+    EventList changeEvents;
+
+    ChangeEdlGenerator().generate(programme, programme, changeEvents);
+
+    RC_ASSERT(changeEvents.size() == programme.size());
+    for (std::size_t i = 0; i < programme.size(); ++i) {
+        const EventBase& change = changeEvents.at(i);
+        const EventBase& event = programme.at(i);
+        RC_ASSERT(change.eventNumber() == i + 1);
+        RC_ASSERT(change.rollName() == event.rollName());
+        RC_ASSERT(change.srcIn() == event.dstIn());
+        RC_ASSERT(change.srcOut() == event.dstOut());
+        RC_ASSERT(change.dstIn() == event.dstIn());
+        RC_ASSERT(change.dstOut() == event.dstOut());
+    }
+}
+
+} // namespace cadrel::tests

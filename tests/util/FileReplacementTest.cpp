@@ -1,0 +1,359 @@
+#include "util/FileReplacement.h"
+
+#include "tests/core/ThrownResult.h"
+#include "tests/util/FileSizeLimit.h"
+#include "tests/util/TempFolder.h"
+#include "util/Result.h"
+
+#include <gtest/gtest.h>
+
+#include <array>
+#include <fcntl.h>
+#include <filesystem>
+#include <string>
+#include <sys/stat.h>
+#include <unistd.h>
+#include <vector>
+
+namespace cadrel::tests {
+namespace {
+
+namespace fs = std::filesystem;
+
+using util::FileReplacement;
+using util::Result;
+
+using Names = std::vector<std::string>;
+
+void replace(const fs::path& target, std::string_view text)
+{
+    FileReplacement file(target);
+    file.write(text);
+    file.commit();
+}
+
+Result::Type resultOfReplacing(const fs::path& target)
+{
+    return thrownBy([&] { replace(target, "new"); });
+}
+
+/// While it lives, the process has no more rights than a user who owns none of its files.
+class NoPrivileges {
+public:
+    NoPrivileges() : former_(geteuid())
+    {
+        constexpr uid_t Nobody = 65534;
+        if (former_ == 0) {
+            EXPECT_EQ(seteuid(Nobody), 0);
+        }
+    }
+    NoPrivileges(const NoPrivileges&) = delete;
+    NoPrivileges& operator=(const NoPrivileges&) = delete;
+    ~NoPrivileges() { EXPECT_EQ(seteuid(former_), 0); }
+
+private:
+    uid_t former_;
+};
+
+TEST(FileReplacement, MakesANewFile)
+{
+    const TempFolder folder;
+
+    replace(folder / "a.txt", "text\n");
+
+    EXPECT_EQ(contentOf(folder / "a.txt"), "text\n");
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, LeavesTheFormerFileUntilItIsCommitted)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+    FileReplacement file(path);
+    file.write("new ");
+    file.write("text");
+    file.finish();
+    EXPECT_EQ(contentOf(path), "former");
+
+    file.commit();
+
+    EXPECT_EQ(contentOf(path), "new text");
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, LeavesNothingBehindWhenItIsDropped)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+
+    FileReplacement(path).write("new");
+    FileReplacement(folder / "b.txt").write("new");
+
+    EXPECT_EQ(contentOf(path), "former");
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, KeepsThePermissionsOfTheFormerFile)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+    const fs::perms ownerAndGroup = fs::perms::owner_read | fs::perms::owner_write | fs::perms::group_read;
+    fs::permissions(path, ownerAndGroup);
+
+    replace(path, "new");
+
+    EXPECT_EQ(fs::status(path).permissions(), ownerAndGroup);
+}
+
+TEST(FileReplacement, TakesANameAsLongAsTheSystemDoes)
+{
+    const TempFolder folder;
+    const std::string name(255, 'n');
+
+    replace(folder / name, "text");
+
+    EXPECT_EQ(folder.names(), Names{name});
+}
+
+TEST(FileReplacement, TakesANameWithoutAFolder)
+{
+    const TempFolder folder;
+    const fs::path former = fs::current_path();
+    fs::current_path(folder.path());
+
+    const Result::Type result = resultOfReplacing("a.txt");
+
+    fs::current_path(former);
+    EXPECT_EQ(result, Result::Ok);
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, ReplacesTheFileBehindALink)
+{
+    const TempFolder folder;
+    fs::create_directory(folder / "reel");
+    folder.write("reel/a.txt", "former");
+    fs::create_symlink("reel/link.txt", folder / "outer.txt");
+    fs::create_symlink("a.txt", folder / "reel/link.txt");
+
+    replace(folder / "outer.txt", "new");
+
+    EXPECT_EQ(contentOf(folder / "reel/a.txt"), "new");
+    EXPECT_TRUE(fs::is_symlink(folder / "outer.txt"));
+    EXPECT_TRUE(fs::is_symlink(folder / "reel/link.txt"));
+}
+
+TEST(FileReplacement, MakesTheFileThatALinkNames)
+{
+    const TempFolder folder;
+    fs::create_symlink(folder / "missing.txt", folder / "link.txt");
+
+    replace(folder / "link.txt", "new");
+
+    EXPECT_EQ(contentOf(folder / "missing.txt"), "new");
+    EXPECT_TRUE(fs::is_symlink(folder / "link.txt"));
+}
+
+TEST(FileReplacement, RefusesALinkToItself)
+{
+    const TempFolder folder;
+    fs::create_symlink("link.txt", folder / "link.txt");
+
+    EXPECT_EQ(resultOfReplacing(folder / "link.txt"), Result::FileAccessFailed);
+    EXPECT_EQ(folder.names(), Names{"link.txt"});
+}
+
+TEST(FileReplacement, RefusesWhatNamesNoFile)
+{
+    const TempFolder folder;
+    fs::create_directory(folder / "reel");
+    folder.write("a.txt", "former");
+
+    EXPECT_EQ(resultOfReplacing(folder / "reel"), Result::FileAccessFailed);
+    EXPECT_EQ(resultOfReplacing(folder / "reel/"), Result::FileAccessFailed);
+    EXPECT_EQ(resultOfReplacing(folder / "missing/"), Result::FileAccessFailed);
+    EXPECT_EQ(resultOfReplacing(folder / "missing/a.txt"), Result::FileAccessFailed);
+    EXPECT_EQ(resultOfReplacing(folder / "a.txt/"), Result::FileAccessFailed);
+    EXPECT_EQ(resultOfReplacing(folder / "a.txt/b.txt"), Result::FileAccessFailed);
+    EXPECT_EQ(resultOfReplacing(folder / std::string(256, 'n')), Result::FileAccessFailed);
+    EXPECT_EQ(resultOfReplacing(""), Result::FileAccessFailed);
+    EXPECT_EQ(folder.names(), (Names{"a.txt", "reel"}));
+    EXPECT_EQ(contentOf(folder / "a.txt"), "former");
+}
+
+TEST(FileReplacement, RefusesAWriteProtectedFile)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+    fs::permissions(path, fs::perms::owner_read | fs::perms::group_read | fs::perms::others_read);
+    fs::permissions(folder.path(), fs::perms::all);
+
+    {
+        const NoPrivileges user;
+        EXPECT_EQ(resultOfReplacing(path), Result::FileAccessFailed);
+        EXPECT_EQ(resultOfReplacing(folder / "b.txt"), Result::Ok);
+    }
+
+    EXPECT_EQ(contentOf(path), "former");
+    EXPECT_EQ(folder.names(), (Names{"a.txt", "b.txt"}));
+}
+
+TEST(FileReplacement, RefusesAWriteProtectedFolder)
+{
+    const TempFolder folder;
+    fs::permissions(folder.path(),
+                    fs::perms::owner_read | fs::perms::owner_exec | fs::perms::others_read | fs::perms::others_exec);
+
+    Result::Type result = Result::Ok;
+    {
+        const NoPrivileges user;
+        result = resultOfReplacing(folder / "a.txt");
+    }
+
+    fs::permissions(folder.path(), fs::perms::owner_all);
+    EXPECT_EQ(result, Result::FileAccessFailed);
+    EXPECT_TRUE(folder.names().empty());
+}
+
+TEST(FileReplacement, WritesADeviceItself)
+{
+    replace("/dev/null", "text");
+
+    EXPECT_TRUE(fs::is_character_file("/dev/null"));
+}
+
+TEST(FileReplacement, ReportsAFullDevice)
+{
+    FileReplacement file("/dev/full");
+    file.write("text");
+
+    EXPECT_EQ(thrownBy([&] { file.finish(); }), Result::FileAccessFailed);
+    EXPECT_EQ(thrownBy([&] { file.commit(); }), Result::FileAccessFailed);
+    EXPECT_TRUE(fs::is_character_file("/dev/full"));
+}
+
+TEST(FileReplacement, WritesAPipeItself)
+{
+    const TempFolder folder;
+    const fs::path path = folder / "pipe";
+    ASSERT_EQ(mkfifo(path.c_str(), 0600), 0);
+    const int reader = open(path.c_str(), O_RDONLY | O_NONBLOCK);
+
+    replace(path, "text");
+
+    std::array<char, 8> bytes{};
+    EXPECT_EQ(read(reader, bytes.data(), bytes.size()), 4);
+    EXPECT_EQ(std::string(bytes.data()), "text");
+    EXPECT_TRUE(fs::is_fifo(path));
+    close(reader);
+}
+
+TEST(FileReplacement, LeavesTheFormerFileWhenTheDiskIsFull)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+    const std::string text(100000, 'x');
+
+    Result::Type result = Result::Ok;
+    {
+        const FileSizeLimit fullDisk(1000);
+        result = thrownBy([&] { replace(path, text); });
+    }
+
+    EXPECT_EQ(result, Result::FileAccessFailed);
+    EXPECT_EQ(contentOf(path), "former");
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, LeavesNothingBehindWhenItsPlaceIsTaken)
+{
+    const TempFolder folder;
+    const fs::path path = folder / "a.txt";
+
+    {
+        FileReplacement file(path);
+        file.write("text");
+        fs::create_directory(path);
+        EXPECT_EQ(thrownBy([&] { file.commit(); }), Result::FileAccessFailed);
+    }
+
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+    EXPECT_TRUE(fs::is_directory(path));
+}
+
+TEST(FileReplacement, KeepsSeveralFilesThatAreAllInPlace)
+{
+    const TempFolder folder;
+    folder.write("a.txt", "former a");
+
+    {
+        FileReplacement a(folder / "a.txt");
+        FileReplacement b(folder / "b.txt");
+        a.write("new a");
+        b.write("new b");
+        a.putInPlace();
+        b.putInPlace();
+        EXPECT_EQ(contentOf(folder / "a.txt"), "new a");
+        EXPECT_EQ(contentOf(folder / "b.txt"), "new b");
+        a.keep();
+        b.keep();
+    }
+
+    EXPECT_EQ(contentOf(folder / "a.txt"), "new a");
+    EXPECT_EQ(contentOf(folder / "b.txt"), "new b");
+    EXPECT_EQ(folder.names(), (Names{"a.txt", "b.txt"}));
+}
+
+TEST(FileReplacement, TakesFilesBackThatAreNotKept)
+{
+    const TempFolder folder;
+    folder.write("a.txt", "former a");
+
+    {
+        FileReplacement a(folder / "a.txt");
+        FileReplacement b(folder / "b.txt");
+        a.write("new a");
+        b.write("new b");
+        a.putInPlace();
+        b.putInPlace();
+    }
+
+    EXPECT_EQ(contentOf(folder / "a.txt"), "former a");
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, MovesNoFolderOutOfItsPlace)
+{
+    const TempFolder folder;
+    const fs::path path = folder / "a.txt";
+
+    {
+        FileReplacement file(path);
+        file.write("text");
+        fs::create_directory(path);
+        EXPECT_EQ(thrownBy([&] { file.putInPlace(); }), Result::FileAccessFailed);
+    }
+
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+    EXPECT_TRUE(fs::is_directory(path));
+}
+
+TEST(FileReplacement, PutsAFileInPlaceOnlyWhenAllOfItIsWritten)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+    FileReplacement file(path);
+
+    Result::Type result = Result::Ok;
+    {
+        const FileSizeLimit fullDisk(1);
+        file.write("new");
+        result = thrownBy([&] { file.putInPlace(); });
+    }
+
+    EXPECT_EQ(result, Result::FileAccessFailed);
+    EXPECT_EQ(contentOf(path), "former");
+}
+
+} // namespace
+} // namespace cadrel::tests
