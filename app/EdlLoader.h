@@ -1,0 +1,48 @@
+#pragma once
+
+#include "core/EventList.h"
+#include "core/Framerate.h"
+
+#include <list>
+#include <string>
+#include <vector>
+
+namespace cadrel::app {
+
+class Terminal;
+
+struct LoadOptions {
+    std::string rateLabel;    ///< one of ProjectFramerate::Labels; empty: what the first file shows
+    bool renameBRolls = true; ///< "A001B" is "A001" where the file holds that too
+    bool acceptAudio = false; ///< events of audio channels are no flaw
+    bool strict = false;      ///< a warning is a failure
+};
+
+struct LoadedEdl {
+    std::string path;
+    core::EventList events;
+    core::Framerate shown; ///< the rate that the file shows; may be unknown
+};
+
+/// Reads EDL files one by one, each into a list of its own, and warns of those that don't fit the project's rate.
+class EdlLoader {
+public:
+    EdlLoader(const LoadOptions& options, Terminal& terminal) : options_(options), terminal_(terminal) {}
+
+    /// The rate under which all files are to be read: that of the label, else that which `firstFile` shows.
+    /// Throws Failure when it shows none.
+    core::Framerate chooseRate(const std::string& firstFile) const;
+
+    /// Reads the files in order under the rate of the installed ProjectFramerate; a file that is named twice is read
+    /// once. Throws Failure for what can't be read, holds no events, or none that are readable.
+    std::list<LoadedEdl> load(const std::vector<std::string>& files) const;
+
+private:
+    void load(LoadedEdl& edl) const;
+    void checkRate(const LoadedEdl& edl) const;
+
+    LoadOptions options_;
+    Terminal& terminal_;
+};
+
+} // namespace cadrel::app

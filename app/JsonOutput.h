@@ -1,0 +1,32 @@
+#pragma once
+
+#include "util/FileReplacement.h"
+
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace cadrel::app {
+
+/// Where `--json` goes: standard output for "-", else a file, which appears only when all of it is written and goes
+/// again unless it is kept. Every failure is thrown as Failure.
+class JsonOutput {
+public:
+    static bool isStandardOutput(const std::string& path) { return path == "-"; }
+
+    explicit JsonOutput(const std::string& path);
+
+    void write(std::string_view text);
+    /// Ends the writing.
+    void finish();
+    void keep();
+
+private:
+    std::string path_;
+    std::optional<util::FileReplacement> file_; ///< nothing for standard output
+};
+
+/// Throws Failure when something that was given to standard output has not been taken.
+void flushStandardOutput();
+
+} // namespace cadrel::app

@@ -1,0 +1,26 @@
+#pragma once
+
+#include "app/Failure.h"
+
+#include <string>
+#include <vector>
+
+namespace cadrel::app {
+
+/// A file name of the command line as the core takes it. Throws Failure for a name that is no UTF-8.
+std::wstring toWide(const std::string& path);
+
+/// Behind the last slash.
+std::string fileNameOf(const std::string& path);
+
+/// Whether both paths name one regular file, or would when it is written.
+bool isSameFile(const std::string& a, const std::string& b);
+
+/// Throws UsageError when writing `output` would overwrite one of the inputs.
+void refuseToOverwrite(const std::vector<std::string>& inputs, const std::string& output);
+
+/// Why a file could not be read or written, as far as the file system tells.
+Failure unreadable(const std::string& path);
+Failure unwritable(const std::string& path);
+
+} // namespace cadrel::app

@@ -1,0 +1,13 @@
+#pragma once
+
+#include "util/StringConverter.h"
+
+namespace cadrel::app {
+
+/// The program speaks the language in which its texts are written.
+class PlainStringConverter : public util::StringConverter {
+public:
+    std::wstring translate(const std::wstring& text) const override { return text; }
+};
+
+} // namespace cadrel::app

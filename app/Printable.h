@@ -1,0 +1,21 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+namespace cadrel::app {
+
+struct PrintableText {
+    std::string text;
+    std::size_t width = 0; ///< in characters
+};
+
+/// The text as a terminal may get it: what is no UTF-8, controls the terminal or turns the writing direction becomes
+/// "?". A text of more than `mostCharacters` is cut and ends in "…".
+PrintableText toPrintable(std::string_view text, std::size_t mostCharacters = std::string_view::npos);
+
+/// Whether the bytes are UTF-8.
+bool isUtf8(std::string_view text);
+
+} // namespace cadrel::app

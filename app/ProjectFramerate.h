@@ -1,0 +1,38 @@
+#pragma once
+
+#include "core/Framerate.h"
+#include "core/FramerateProvider.h"
+
+#include <array>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace cadrel::app {
+
+/// Stands in for a project: while it lives, all timecodes are read under its rate.
+class ProjectFramerate : public core::FramerateProvider {
+public:
+    /// The labels of all rates that a project can have.
+    static constexpr std::array<std::string_view, 10> Labels{"23.98 fps", "24 fps",     "24.98 fps", "25 fps",
+                                                             "29.97 fps", "29.97 dfps", "30 fps",    "30 dfps",
+                                                             "59.94 fps", "60 fps"};
+
+    explicit ProjectFramerate(const core::Framerate& framerate);
+    ProjectFramerate(const ProjectFramerate&) = delete;
+    ProjectFramerate& operator=(const ProjectFramerate&) = delete;
+    ~ProjectFramerate();
+
+    core::Framerate getFramerate() const override { return framerate_; }
+
+    /// The rate that a file shows, as a project has it: an unknown drop-frame state counts as non-drop. Nothing when
+    /// the file shows no rate.
+    static std::optional<core::Framerate> fromShownRate(const core::Framerate& shown);
+    /// The label of a rate of the table.
+    static std::string labelOf(const core::Framerate& framerate);
+
+private:
+    core::Framerate framerate_;
+};
+
+} // namespace cadrel::app

@@ -1,0 +1,77 @@
+#include "app/Terminal.h"
+
+#include "app/Printable.h"
+
+#include <cstdlib>
+#include <iostream>
+#include <string_view>
+#include <unistd.h>
+
+namespace cadrel::app {
+
+namespace {
+
+std::string sentence(const Failure& failure)
+{
+    return toPrintable(failure.problem).text + "; " + toPrintable(failure.remedy).text;
+}
+
+std::string environment(const char* name)
+{
+    const char* value = std::getenv(name);
+    return value == nullptr ? std::string() : std::string(value);
+}
+
+} // namespace
+
+Terminal::Terminal() : showsProgress_(isatty(STDERR_FILENO) == 1 && environment("TERM") != "dumb") {}
+
+Terminal::~Terminal()
+{
+    clearProgress();
+}
+
+void Terminal::showProgress(const std::string& what)
+{
+    if (showsProgress_) {
+        clearProgress();
+        std::cerr << toPrintable(what, 70).text << std::flush;
+        progressShown_ = true;
+    }
+}
+
+void Terminal::clearProgress()
+{
+    if (progressShown_) {
+        std::cerr << "\r\033[K" << std::flush;
+        progressShown_ = false;
+    }
+}
+
+void Terminal::warn(const Failure& failure)
+{
+    writeLine(toPrintable(failure.file).text + ": warning: " + sentence(failure));
+}
+
+void Terminal::report(const Failure& failure)
+{
+    writeLine(toPrintable(failure.file).text + ": " + sentence(failure));
+}
+
+void Terminal::report(const UsageError& error)
+{
+    writeLine(toPrintable(error.problem).text + "; see --help");
+}
+
+bool Terminal::wantsColour()
+{
+    return isatty(STDOUT_FILENO) == 1 && environment("NO_COLOR").empty() && environment("TERM") != "dumb";
+}
+
+void Terminal::writeLine(const std::string& text)
+{
+    clearProgress();
+    std::cerr << "cadrel: " + text + "\n" << std::flush;
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,35 @@
+#pragma once
+
+#include "app/Failure.h"
+
+#include <string>
+
+namespace cadrel::app {
+
+/// Standard error: messages, a line each, and on a terminal a progress line that gives way to whatever comes next.
+class Terminal {
+public:
+    Terminal();
+    Terminal(const Terminal&) = delete;
+    Terminal& operator=(const Terminal&) = delete;
+    ~Terminal();
+
+    /// Shows what is being done, on a terminal only.
+    void showProgress(const std::string& what);
+    void clearProgress();
+
+    void warn(const Failure& failure);
+    void report(const Failure& failure);
+    void report(const UsageError& error);
+
+    /// Whether standard output is a terminal whose user hasn't asked for plain text.
+    static bool wantsColour();
+
+private:
+    void writeLine(const std::string& text);
+
+    bool showsProgress_;
+    bool progressShown_ = false;
+};
+
+} // namespace cadrel::app

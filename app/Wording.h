@@ -1,0 +1,15 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+namespace cadrel::app {
+
+/// "1 event", "2 events".
+std::string counted(std::size_t count, const std::string& word);
+
+/// "a, b, c".
+std::string joined(const std::vector<std::string>& texts);
+
+} // namespace cadrel::app

@@ -1,0 +1,288 @@
+#include "tests/app/Film.h"
+#include "tests/app/ProgramRun.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace {
+
+using namespace cadrel::tests;
+using nlohmann::json;
+
+/// The work stops with 1 and one line: program, file, what is wrong, what to do.
+void expectStopped(const Outcome& outcome, const std::string& line)
+{
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err, "cadrel: " + line + "\n");
+}
+
+/// A file is refused by both commands, on either side.
+void expectRefused(const std::string& file, const std::string& problem)
+{
+    const TempFolder folder;
+    const std::string good = folder.write("good.edl", oldCut());
+
+    expectStopped(runCadrel({"list", file}), file + ": " + problem);
+    expectStopped(runCadrel({"generate", "--old", file, "--new", good, "-o", folder / "change.edl"}),
+                  file + ": " + problem);
+    expectStopped(runCadrel({"generate", "--old", good, "--new", file, "-o", folder / "change.edl"}),
+                  file + ": " + problem);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"good.edl"}));
+}
+
+TEST(BadInput, NoSuchFile)
+{
+    const TempFolder folder;
+
+    expectRefused(folder / "none.edl", "no such file; check the name and the folder");
+    expectRefused(folder / "none/none.edl", "no such file; check the name and the folder");
+    expectRefused(folder.write("file", "x") + "/none.edl", "no such file; check the name and the folder");
+    expectRefused("", "no such file; check the name and the folder");
+}
+
+TEST(BadInput, AFolderOrADevice)
+{
+    const TempFolder folder;
+    const std::string pipe = folder / "pipe";
+    ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
+
+    std::filesystem::create_directory(folder / "reel");
+    expectRefused(folder / "reel", "is a folder; give the EDL files in it");
+    expectRefused("/dev/null", "is a device; give an EDL file");
+    expectRefused("/dev/zero", "is a device; give an EDL file");
+    expectRefused(pipe, "is a pipe; write it into a file first");
+}
+
+TEST(BadInput, AFileWhoseReadingBreaksOff)
+{
+    expectRefused("/proc/self/mem", "can't be read to its end; check the disk or copy the file anew");
+}
+
+TEST(BadInput, AFileWithoutTheRightToRead)
+{
+    if (geteuid() == 0)
+        GTEST_SKIP() << "root may read everything";
+    const TempFolder folder;
+    const std::string file = folder.write("secret.edl", oldCut());
+    std::filesystem::permissions(file, std::filesystem::perms::none);
+
+    expectRefused(file, "you may not read it; ask its owner for the right to read");
+}
+
+TEST(BadInput, AFileWithoutEvents)
+{
+    const TempFolder folder;
+
+    expectRefused(folder.write("empty.edl", ""), "holds no events; give a CMX EDL");
+    expectRefused(folder.write("title.edl", "TITLE: REEL 3\nFCM: NON-DROP FRAME\n* A COMMENT\n"),
+                  "holds no events; give a CMX EDL");
+    expectRefused(folder.write("short.edl", "001 AX V D 024 01:00:00:12\n"), "holds no events; give a CMX EDL");
+}
+
+TEST(BadInput, ABinaryFile)
+{
+    const TempFolder folder;
+    std::string bytes;
+    for (int count = 0; count < 4096; ++count) {
+        // All but the digits, which would begin an event.
+        for (int byte = 0; byte < 256; ++byte) {
+            if (byte < '0' || byte > '9')
+                bytes += static_cast<char>(byte);
+        }
+    }
+
+    expectRefused(folder.write("picture.mov", bytes), "holds no events; give a CMX EDL");
+}
+
+TEST(BadInput, AFileWithoutAReadableEvent)
+{
+    const TempFolder folder;
+
+    expectRefused(folder.write("sound.edl", "001 AX A C 01:00:00:12 01:00:01:00 01:00:00:00 01:00:00:12\n"),
+                  "holds no event that can be read (the first: Not a video event.); give the EDL of a picture track, "
+                  "or list it with --audio");
+    expectRefused(folder.write("mail.txt", "1 a b c d e f g h i j k\n"),
+                  "holds no event that can be read (the first: Detected uninitialized timecode.); give a CMX EDL");
+}
+
+TEST(BadInput, AFileThatShowsNoRate)
+{
+    const TempFolder folder;
+    const std::string file =
+        folder.write("film.edl", cut("001", "A001", "10:00:00:00 10:00:04:00", "01:00:00:00 01:00:04:00"));
+
+    expectStopped(runCadrel({"list", file}),
+                  file + ": shows no frame rate; give it with --rate, such as --rate \"24 fps\"");
+    EXPECT_EQ(runCadrel({"list", file, "--rate", "25 fps"}).status, 0);
+}
+
+TEST(BadInput, ALineOf100Megabytes)
+{
+    const TempFolder folder;
+    const std::string file = folder.write("long.edl", oldCut());
+    {
+        std::ofstream stream(file, std::ios::binary | std::ios::app);
+        const std::string part(1000000, 'A');
+        stream << "004  A004  V  C  10:00:00:00 10:00:04:00 01:00:30:00 01:00:34:00\n* FROM CLIP NAME: ";
+        for (int count = 0; count < 100; ++count)
+            stream << part;
+    }
+
+    const Outcome outcome = runCadrel({"list", file});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.err, "");
+    EXPECT_NE(outcome.out.find("A004  " + std::string(39, 'A') + "…  long.edl"), std::string::npos);
+}
+
+TEST(BadInput, NamesWithBlanksAndForeignLettersAreGood)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("Rolle 3 \xc3\xa4lt.edl", oldCut());
+    const std::string newFile = folder.write("\xe6\x96\xb0 cut.edl", newCut());
+    const std::string change = folder / "\xc3\x84nderung 3.edl";
+
+    const Outcome outcome = runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", change});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_TRUE(std::filesystem::exists(change));
+    EXPECT_TRUE(outcome.out.starts_with("Old cut     Rolle 3 \xc3\xa4lt.edl: 3 events")) << outcome.out;
+}
+
+TEST(BadInput, AFileNameThatIsNoUtf8)
+{
+    const TempFolder folder;
+    const std::string file = folder.write("caf\xe9.edl", oldCut());
+    const std::string good = folder.write("good.edl", oldCut());
+
+    expectStopped(runCadrel({"list", file}),
+                  folder / "caf?.edl" + ": the name is no UTF-8 text; rename the file or its folder");
+    expectStopped(runCadrel({"generate", "--old", good, "--new", good, "-o", folder / "caf\xe9"}),
+                  folder / "caf?" + ": the name is no UTF-8 text; rename the file or its folder");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"caf\xe9.edl", "good.edl"}));
+}
+
+TEST(BadInput, ANameCantForgeASecondLine)
+{
+    const Outcome outcome = runCadrel({"list", "a\nb\033[2J"});
+
+    EXPECT_EQ(outcome.err, "cadrel: a?b?[2J: no such file; check the name and the folder\n");
+}
+
+/// An output that can't be written, in the place of the change EDL and in that of the JSON.
+void expectUnwritable(const std::string& path, const std::string& problem)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const std::vector<std::string> command{"generate", "--old", oldFile, "--new", newFile};
+    const auto with = [&command](const std::vector<std::string>& more) {
+        std::vector<std::string> arguments = command;
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        return runCadrel(arguments);
+    };
+
+    expectStopped(with({"-o", path}), path + ": " + problem);
+    expectStopped(with({"-o", path, "--json", folder / "change.json"}), path + ": " + problem);
+    expectStopped(with({"-o", folder / "change.edl", "--json", path}), path + ": " + problem);
+    expectStopped(runCadrel({"list", oldFile, "--json", path}), path + ": " + problem);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
+}
+
+TEST(BadOutput, AFullDisk)
+{
+    expectUnwritable("/dev/full", "can't be written; see whether the disk is full or the file protected");
+}
+
+TEST(BadOutput, AFolderThatDoesNotExist)
+{
+    const TempFolder folder;
+
+    expectUnwritable(folder / "none/change.edl", "the folder does not exist; make it or give another");
+    expectUnwritable(folder.write("file", "x") + "/change.edl",
+                     "what should be the folder is a file; give another name");
+}
+
+TEST(BadOutput, AFolderInThePlaceOfTheFile)
+{
+    const TempFolder folder;
+
+    std::filesystem::create_directory(folder / "reel");
+    expectUnwritable(folder / "reel", "is a folder; give the name of a file in it");
+    expectUnwritable(folder / "reel/", "is a folder; give the name of a file in it");
+    EXPECT_TRUE(std::filesystem::is_empty(folder / "reel"));
+}
+
+TEST(BadOutput, AFolderThatTakesNoFiles)
+{
+    const std::string path = "/proc/change.edl";
+    const bool mayWrite = access("/proc", W_OK) == 0; // root is not held back by rights, but the system is
+
+    expectUnwritable(path, mayWrite ? "can't be written; see whether the disk is full or the file protected"
+                                    : "you may not write into the folder; give another folder");
+}
+
+TEST(BadOutput, AFormerFileStaysWhenTheRunFails)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const std::string change = folder.write("change.edl", "former list");
+    const std::string document = folder.write("change.json", "former document");
+
+    EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", change, "--json", "/dev/full"}).status,
+              1);
+    EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", "/dev/full", "--json", document}).status,
+              1);
+
+    EXPECT_EQ(contentOf(change), "former list");
+    EXPECT_EQ(contentOf(document), "former document");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.edl", "change.json", "new.edl", "old.edl"}));
+}
+
+TEST(BadOutput, StandardOutputThatTakesNothing)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string line = "standard output: can't be written; see whether the disk is full";
+
+    expectStopped(runCadrel({"list", oldFile}, "/dev/full"), line);
+    expectStopped(runCadrel({"list", oldFile, "--json", "-"}, "/dev/full"), line);
+    expectStopped(runCadrel({"--help"}, "/dev/full"), line);
+    expectStopped(
+        runCadrel({"generate", "--old", oldFile, "--new", oldFile, "-o", folder / "change.edl", "--json", "-"},
+                  "/dev/full"),
+        line);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"old.edl"}));
+}
+
+TEST(BadOutput, AFileCompletelyWrittenStaysWhenTheSummaryCantBeShown)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+
+    const Outcome outcome =
+        runCadrel({"generate", "--old", oldFile, "--new", oldFile, "-o", folder / "change.edl"}, "/dev/full");
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.edl", "old.edl"}));
+}
+
+TEST(BadOutput, DevicesAreWrittenAndStay)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+
+    EXPECT_EQ(
+        runCadrel({"generate", "--old", oldFile, "--new", oldFile, "-o", "/dev/null", "--json", "/dev/null"}).status,
+        0);
+    EXPECT_FALSE(std::filesystem::is_regular_file("/dev/null"));
+}
+
+} // namespace

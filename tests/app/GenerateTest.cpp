@@ -1,0 +1,395 @@
+#include "tests/app/Film.h"
+#include "tests/app/ProgramRun.h"
+
+#include <array>
+#include <cstdio>
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+
+namespace {
+
+using namespace cadrel::tests;
+using nlohmann::json;
+
+/// An old and a new cut in a folder of their own.
+class Film {
+public:
+    Film(const std::string& oldText, const std::string& newText)
+        : oldFile(folder.write("old.edl", oldText)), newFile(folder.write("new.edl", newText))
+    {
+    }
+
+    Outcome generate(const std::vector<std::string>& more = {}) const
+    {
+        std::vector<std::string> arguments{"generate", "--old", oldFile, "--new", newFile};
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        return runCadrel(arguments);
+    }
+    json generateAsJson(std::vector<std::string> more = {}) const
+    {
+        more.insert(more.end(), {"--json", "-"});
+        const Outcome outcome = generate(more);
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return json::parse(outcome.out);
+    }
+
+    const TempFolder folder;
+    const std::string oldFile;
+    const std::string newFile;
+};
+
+/// "SRC IN-SRC OUT>DST IN-DST OUT" of each event.
+std::vector<std::string> timesOf(const json& events)
+{
+    std::vector<std::string> times;
+    for (const json& event : events) {
+        const auto text = [&event](const char* key) { return event.at(key).get<std::string>(); };
+        times.push_back(text("srcIn") + "-" + text("srcOut") + ">" + text("dstIn") + "-" + text("dstOut"));
+    }
+    return times;
+}
+
+/// `seconds` after 01:00:00:00.
+std::string at(int seconds)
+{
+    std::array<char, 16> text{};
+    std::snprintf(text.data(), text.size(), "%02d:%02d:%02d:00", 1 + seconds / 3600, seconds / 60 % 60, seconds % 60);
+    return text.data();
+}
+
+/// Shots of a second each, one after the other; frame 12 shows that there are 24.
+std::string manyShots(int count)
+{
+    std::string text;
+    for (int shot = 0; shot < count; ++shot) {
+        std::string roll = "R";
+        roll += std::to_string(shot);
+        text += cut("001", roll, "10:00:00:12 10:00:01:12", at(shot) + " " + at(shot + 1));
+    }
+    return text;
+}
+
+TEST(Generate, WritesTheChangeEdl)
+{
+    const Film film(oldCut(), newCut());
+
+    const Outcome outcome = film.generate({"-o", film.folder / "change.edl"});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.err, "");
+    EXPECT_EQ(contentOf(film.folder / "change.edl"),
+              "TITLE:   change.edl\n"
+              "001  A001     V     C        01:00:00:00 01:00:10:00 01:00:00:00 01:00:10:00\n"
+              "002  A002     V     C        01:00:12:00 01:00:20:00 01:00:10:00 01:00:18:00\n"
+              "003  A003     V     C        01:00:20:00 01:00:30:00 01:00:22:00 01:00:32:00\n");
+    EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"change.edl", "new.edl", "old.edl"}));
+}
+
+TEST(Generate, PrintsASummary)
+{
+    const Film film(oldCut(), newCut());
+
+    const Outcome outcome = film.generate({"-o", film.folder / "change.edl"});
+
+    EXPECT_EQ(outcome.out, "Old cut     old.edl: 3 events, all valid\n"
+                           "New cut     new.edl: 4 events, all valid\n"
+                           "Frame rate  24 fps, as the old cut shows\n"
+                           "Change EDL  3 events\n"
+                           "Covered     00:00:28:00 of 00:00:32:00, 87.5 %\n"
+                           "Inserts     1, together 00:00:04:00\n"
+                           "\n"
+                           "            in           out          length       shot\n"
+                           "            01:00:18:00  01:00:22:00  00:00:04:00  NEW\n"
+                           "\n"
+                           "Written     " +
+                               film.folder / "change.edl" + "\n");
+}
+
+TEST(Generate, WithoutAFileThereIsOnlyTheSummary)
+{
+    const Film film(oldCut(), newCut());
+
+    const Outcome outcome = film.generate();
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_TRUE(outcome.out.ends_with("Written     nothing; give -o CHANGE.edl\n")) << outcome.out;
+    EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
+}
+
+TEST(Generate, JsonTellsTheEventsAndTheSummary)
+{
+    const Film film(oldCut(), newCut());
+
+    const json document = film.generateAsJson({"-o", film.folder / "change.edl"});
+
+    ASSERT_EQ(document.at("events").size(), 3U);
+    EXPECT_EQ(document.at("events").at(1), json::parse(R"({"number": 2, "kind": "plain", "roll": "A002",
+        "clip": "TWO", "transition": "cut", "duration": 0, "srcIn": "01:00:12:00", "srcOut": "01:00:20:00",
+        "dstIn": "01:00:10:00", "dstOut": "01:00:18:00", "speed": 1.0, "vfx": false, "flaws": [], "edlFile": "",
+        "members": []})"));
+    EXPECT_EQ(document.at("rate"), "24 fps");
+    EXPECT_EQ(document.at("old"), json::parse(R"({"files": ["old.edl"], "events": 3, "invalid": 0})"));
+    EXPECT_EQ(document.at("new"), json::parse(R"({"files": ["new.edl"], "events": 4, "invalid": 0})"));
+    EXPECT_EQ(document.at("programmeFrames"), 32 * 24);
+    EXPECT_EQ(document.at("coveredFrames"), 28 * 24);
+    EXPECT_EQ(document.at("inserts"), json::parse(R"([{"dstIn": "01:00:18:00", "dstOut": "01:00:22:00",
+        "frames": 96, "shot": "NEW", "moreShots": 0}])"));
+    EXPECT_EQ(document.at("written"), json({film.folder / "change.edl"}));
+}
+
+TEST(Generate, TouchingNeighboursAreHealed)
+{
+    const Film film(oldCut(), oldCut());
+
+    const json document = film.generateAsJson();
+
+    ASSERT_EQ(timesOf(document.at("events")),
+              (std::vector<std::string>{"01:00:00:00-01:00:30:00>01:00:00:00-01:00:30:00"}));
+    const json& healed = document.at("events").at(0);
+    EXPECT_EQ(healed.at("kind"), "healed");
+    EXPECT_EQ(healed.at("roll"), "Healed Event 001");
+    EXPECT_EQ(timesOf(healed.at("members")),
+              (std::vector<std::string>{"01:00:00:00-01:00:10:00>01:00:00:00-01:00:10:00",
+                                        "01:00:10:00-01:00:20:00>01:00:10:00-01:00:20:00",
+                                        "01:00:20:00-01:00:30:00>01:00:20:00-01:00:30:00"}));
+    EXPECT_EQ(healed.at("members").at(2).at("roll"), "A003");
+    EXPECT_EQ(document.at("healed"), json::parse(R"({"events": 1, "members": 3})"));
+    EXPECT_NE(film.generate().out.find("Change EDL  1 event, 1 of them healed from 3\n"), std::string::npos);
+}
+
+TEST(Generate, HealModesDifferInWhatMayLieInAGap)
+{
+    // Between A and C, which keep their distance, B has given place to another shot; between C and E nothing stands.
+    const std::string a = cut("001", "A", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00");
+    const std::string c = cut("003", "C", "10:00:00:12 10:00:10:12", "01:00:20:00 01:00:30:00");
+    const std::string e = cut("004", "E", "10:00:00:12 10:00:10:12", "01:00:40:00 01:00:50:00");
+    const std::string f = cut("005", "F", "10:00:00:12 10:00:10:12", "01:00:50:00 01:01:00:00");
+    const Film film(a + cut("002", "B", "10:00:00:12 10:00:10:12", "01:00:10:00 01:00:20:00") + c + e + f,
+                    a + cut("002", "X", "10:00:00:12 10:00:10:12", "01:00:10:00 01:00:20:00") + c + e + f);
+    const auto countWith = [&film](const std::string& mode) {
+        return film.generateAsJson({"--heal", mode}).at("events").size();
+    };
+
+    EXPECT_EQ(countWith("none"), 4U);
+    EXPECT_EQ(countWith("normal"), 3U);  // A, C, E+F
+    EXPECT_EQ(countWith("gaps"), 2U);    // A, C+E+F
+    EXPECT_EQ(countWith("inserts"), 1U); // A+C+E+F
+}
+
+TEST(Generate, MatchesByTheChosenName)
+{
+    const Film film(cut("001", "A001", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00") + clipName("SAME"),
+                    cut("001", "A777", "10:00:00:12 10:00:10:12", "01:00:05:00 01:00:15:00") + clipName("SAME"));
+
+    EXPECT_EQ(timesOf(film.generateAsJson({"--match", "clip"}).at("events")),
+              (std::vector<std::string>{"01:00:00:00-01:00:10:00>01:00:05:00-01:00:15:00"}));
+    EXPECT_EQ(film.generate({"--match", "roll"}).status, 1);
+}
+
+TEST(Generate, VfxVersionsAreOneShot)
+{
+    const Film film(cut("001", "VFX_010_v003_comp", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00"),
+                    cut("001", "VFX_010_v012_comp", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00"));
+
+    const json events = film.generateAsJson({"--vfx", "VFX_***_v,_comp"}).at("events");
+
+    ASSERT_EQ(events.size(), 1U);
+    EXPECT_EQ(events[0].at("roll"), "VFX_010_v012_comp");
+    EXPECT_EQ(events[0].at("vfx"), true);
+    EXPECT_EQ(film.generate().status, 1);
+}
+
+TEST(Generate, BRollsAreRenamedInBothCuts)
+{
+    const Film film(cut("001", "A001", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00"),
+                    cut("001", "A002", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00") +
+                        cut("002", "A001B", "10:00:00:12 10:00:04:12", "01:00:10:00 01:00:14:00") +
+                        cut("003", "A001", "12:00:00:12 12:00:10:12", "01:00:14:00 01:00:24:00"));
+
+    EXPECT_EQ(timesOf(film.generateAsJson().at("events")),
+              (std::vector<std::string>{"01:00:00:00-01:00:04:00>01:00:10:00-01:00:14:00"}));
+    EXPECT_EQ(film.generate({"--no-b-roll"}).status, 1);
+}
+
+TEST(Generate, EachSideTakesSeveralFiles)
+{
+    const TempFolder folder;
+    const std::string a =
+        folder.write("a.edl", cut("001", "A001", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00"));
+    const std::string b =
+        folder.write("b.edl", cut("001", "A002", "10:00:00:12 10:00:10:12", "01:00:10:00 01:00:20:00"));
+    const std::string both =
+        folder.write("both.edl", cut("001", "A002", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00") +
+                                     cut("002", "A001", "10:00:00:12 10:00:10:12", "01:00:10:00 01:00:20:00"));
+
+    const Outcome outcome = runCadrel({"generate", "--old", a, b, "--new", both, "--json", "-"});
+
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(timesOf(json::parse(outcome.out).at("events")),
+              (std::vector<std::string>{"01:00:10:00-01:00:20:00>01:00:00:00-01:00:10:00",
+                                        "01:00:00:00-01:00:10:00>01:00:10:00-01:00:20:00"}));
+}
+
+TEST(Generate, MoreThan999EventsGoIntoSeveralFiles)
+{
+    const Film film(manyShots(1000), manyShots(1000));
+
+    const Outcome outcome = film.generate({"-o", film.folder / "change.edl", "--heal", "none"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"change_1.edl", "change_2.edl", "new.edl", "old.edl"}));
+    // Shot 999 plays from 01:16:39:00.
+    EXPECT_EQ(contentOf(film.folder / "change_2.edl"),
+              "TITLE:   change_2.edl\n"
+              "001  R999     V     C        01:16:39:00 01:16:40:00 01:16:39:00 01:16:40:00\n");
+    EXPECT_TRUE(outcome.out.ends_with("Written     " + film.folder / "change_1.edl" + ", " +
+                                      film.folder / "change_2.edl" + "\n"))
+        << outcome.out;
+}
+
+TEST(Generate, TheFilesOfALongListDontOverwriteAnInputEither)
+{
+    const TempFolder folder;
+    const std::string shots = manyShots(1000);
+    const std::string file = folder.write("change_2.edl", shots);
+
+    const Outcome outcome =
+        runCadrel({"generate", "--old", file, "--new", file, "-o", folder / "change.edl", "--heal", "none"});
+
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(contentOf(file), shots);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"change_2.edl"}));
+}
+
+TEST(Generate, NothingThatSurvivesIsToldAndWritesNoFile)
+{
+    const Film film(oldCut(), cut("001", "B009", "05:00:00:00 05:00:04:12", "01:00:00:00 01:00:04:12"));
+
+    const Outcome outcome = film.generate({"-o", film.folder / "change.edl", "--json", film.folder / "change.json"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err, "cadrel: " + film.oldFile + ", " + film.newFile +
+                               ": nothing of the old cut survives in the new one, so there is no change EDL; "
+                               "see that both are of one reel, and try --match or --vfx\n");
+    EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
+}
+
+TEST(Generate, InsertsAreTheUnionOfWhatIsNotCovered)
+{
+    // A picture event whose roll can't be read needs sound, an audio event doesn't; a gap of the cut is no programme.
+    const Film film(oldCut(), cut("001", "A001", "10:00:00:00 10:00:04:00", "01:00:00:00 01:00:04:00") +
+                                  cut("002", "X+1", "10:00:00:00 10:00:02:00", "01:00:04:00 01:00:06:00") +
+                                  clipName("UNREADABLE") +
+                                  cut("003", "X002", "10:00:00:00 10:00:02:00", "01:00:06:00 01:00:08:00") +
+                                  "004  X003  A  C  10:00:00:00 10:00:02:00 01:00:08:00 01:00:10:00\n" +
+                                  cut("005", "X004", "10:00:00:00 10:00:01:00", "01:00:20:00 01:00:21:00"));
+
+    const json document = film.generateAsJson();
+
+    EXPECT_EQ(document.at("programmeFrames"), (8 + 1) * 24);
+    EXPECT_EQ(document.at("coveredFrames"), 4 * 24);
+    EXPECT_EQ(document.at("inserts"), json::parse(R"([
+        {"dstIn": "01:00:04:00", "dstOut": "01:00:08:00", "frames": 96, "shot": "UNREADABLE", "moreShots": 1},
+        {"dstIn": "01:00:20:00", "dstOut": "01:00:21:00", "frames": 24, "shot": "X004", "moreShots": 0}])"));
+    EXPECT_EQ(document.at("new").at("invalid"), 2);
+}
+
+TEST(Generate, OverlappingEventsOfTheNewCutCountOnce)
+{
+    // A001 returns for its first two seconds at 01:00:02:00; the long shot under it lasts on to 01:00:08:00.
+    const Film film(cut("001", "A001", "10:00:00:12 10:00:02:12", "01:00:00:00 01:00:02:00"),
+                    cut("001", "X001", "10:00:00:12 10:00:08:12", "01:00:00:00 01:00:08:00") + clipName("LONG") +
+                        cut("002", "A001", "10:00:00:12 10:00:02:12", "01:00:02:00 01:00:04:00"));
+
+    const json document = film.generateAsJson();
+
+    EXPECT_EQ(document.at("programmeFrames"), 8 * 24);
+    EXPECT_EQ(document.at("coveredFrames"), 2 * 24);
+    EXPECT_EQ(document.at("inserts"), json::parse(R"([
+        {"dstIn": "01:00:00:00", "dstOut": "01:00:02:00", "frames": 48, "shot": "LONG", "moreShots": 0},
+        {"dstIn": "01:00:04:00", "dstOut": "01:00:08:00", "frames": 96, "shot": "LONG", "moreShots": 0}])"));
+}
+
+TEST(Generate, AllButAFrameIsNotAHundredPercent)
+{
+    // 9600 frames, one of which is new.
+    const Film film(cut("001", "A001", "10:00:00:00 10:06:39:23", "01:00:00:00 01:06:39:23"),
+                    cut("001", "A001", "10:00:00:00 10:06:39:23", "01:00:00:00 01:06:39:23") +
+                        cut("002", "X001", "10:00:00:00 10:00:00:01", "01:06:39:23 01:06:40:00"));
+
+    EXPECT_NE(film.generate().out.find("Covered     00:06:39:23 of 00:06:40:00, 99.9 %\n"), std::string::npos);
+}
+
+TEST(Generate, AFailureNamesBothEventsThatCantBeMatched)
+{
+    // 2512 frames of source fill 2500 frames of programme up to the last frame of the day: the speed counts as normal,
+    // so that the stretch is taken to be as long as the source and would end behind midnight.
+    const std::string speedy = cut("003", "A009", "01:00:00:00 01:01:40:12", "23:58:19:24 23:59:59:24");
+    const std::string fine = cut("001", "A001", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
+    const Film film(fine + cut("002", "A002", "10:00:00:00 10:00:10:00", "01:00:10:00 01:00:20:00") + speedy,
+                    fine + speedy);
+
+    const Outcome outcome = film.generate({"-o", film.folder / "change.edl"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err,
+              "cadrel: new.edl: event 3 of new.edl (A009) can't be matched with event 3 of old.edl (A009): "
+              "a time would fall outside the 24 hours of a day; correct its timecodes or leave it out\n");
+    EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
+}
+
+TEST(Generate, AFailureNamesTheEventThatCantBeUsed)
+{
+    // A transition of 9,999,999 frames is longer than a day.
+    const std::string endless = "002  A009  V  D  9999999  01:00:00:00 01:00:10:12 01:00:10:00 01:00:20:12\n";
+    const std::string fine = cut("001", "A001", "10:00:00:00 10:00:10:12", "01:00:00:00 01:00:10:12");
+
+    const Film inOld(fine + endless, fine);
+    const Film inNew(fine, fine + endless + cut("003", "A003", "10:00:00:00 10:00:10:00", "01:00:30:00 01:00:40:00"));
+
+    const std::string reason = " (A009) can't be used: a time would fall outside the 24 hours of a day; "
+                               "correct its timecodes or leave it out\n";
+    EXPECT_EQ(inOld.generate().err, "cadrel: old.edl: event 2 of old.edl" + reason);
+    EXPECT_EQ(inNew.generate().err, "cadrel: new.edl: event 2 of new.edl" + reason);
+}
+
+TEST(Generate, WarningsNameTheFileAndStrictStops)
+{
+    const Film film(oldCut(), newCut() + cut("005", "A009", "10:00:00:00 10:00:10:24", "01:01:00:00 01:01:10:24"));
+
+    const Outcome warned = film.generate();
+    const Outcome strict = film.generate({"--strict", "-o", film.folder / "change.edl"});
+
+    EXPECT_EQ(warned.status, 0);
+    EXPECT_EQ(warned.err, "cadrel: " + film.newFile +
+                              ": warning: shows 25 fps, more than the 24 fps of the project, first in line 10: "
+                              "\"005  A009  V  C  10:00:00:00 10:00:10:24 01:01:00:00 01:01:10:24\"; "
+                              "check the file or give another --rate\n");
+    EXPECT_NE(warned.out.find("New cut     new.edl: 5 events, 1 invalid\n"), std::string::npos) << warned.out;
+    EXPECT_EQ(strict.status, 1);
+    EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
+}
+
+TEST(Generate, TheExampleReelGivesAChangeEdlWhoseEventsKeepTheirLength)
+{
+    const TempFolder folder;
+    const std::string examples = CADREL_EXAMPLES;
+
+    const Outcome outcome =
+        runCadrel({"generate", "--old", examples + "/reel3/reel3_v07.edl", "--new", examples + "/reel3/reel3_v12.edl",
+                   "--vfx", "VFX_****_v,_comp", "-o", folder / "change.edl", "--json", folder / "change.json"});
+
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(outcome.err, "");
+    const json document = json::parse(contentOf(folder / "change.json"));
+    EXPECT_FALSE(document.at("events").empty());
+    for (const json& event : document.at("events")) {
+        EXPECT_EQ(event.at("flaws"), json::array());
+        EXPECT_EQ(event.at("speed"), 1.0);
+    }
+    EXPECT_EQ(document.at("programmeFrames"), ((15 * 60) + 7) * 24 + 20);
+}
+
+} // namespace
