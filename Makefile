@@ -1,0 +1,50 @@
+# Each target does all its own set-up: it installs what is missing, configures and builds.
+#
+#   make run            the change EDL of the example reel, into build/run
+#   make test           every test; PRESET=asan runs them under the sanitizers
+#   make build          the programs into build/release/bin, the libraries into build/release/lib
+#   make bench          the benchmarks, and the whole program against its bounds
+#   make fuzz           every fuzzer for FUZZ_SECONDS from its corpus
+#   make format         formats every C++ file; make check-format only looks
+
+PRESET ?= release
+FUZZ_SECONDS ?= 20
+
+sources = $(shell find src app tests bench fuzz -name '*.cpp' -o -name '*.h')
+reel3 = examples/reel3
+
+.PHONY: run test build bench fuzz format check-format clean
+
+run:
+	@cmake/build.sh release cadrel
+	@mkdir -p build/run
+	build/release/bin/cadrel generate --old $(reel3)/reel3_v07.edl --new $(reel3)/reel3_v12.edl \
+	    --vfx 'VFX_****_v,_comp' -o build/run/reel3_change.edl --json build/run/reel3_change.json
+
+test:
+	@cmake/build.sh $(PRESET)
+	ctest --test-dir build/$(PRESET) --parallel $$(nproc) --output-on-failure --no-tests=error \
+	    --output-junit $(CURDIR)/build/$(PRESET)/tests.xml
+
+build:
+	@cmake/build.sh $(PRESET)
+
+bench:
+	@cmake/build.sh release cadrel cadrel_bench cadrel_bench_program
+	build/release/bin/cadrel_bench
+	build/release/bin/cadrel_bench_program build/release/bin/cadrel build/bench
+
+fuzz:
+	@cmake/build.sh fuzz fuzzers
+	fuzz/run.sh build/fuzz $(FUZZ_SECONDS)
+
+format:
+	@cmake/install-packages.sh format
+	@clang-format -i $(sources)
+
+check-format:
+	@cmake/install-packages.sh format
+	@clang-format --dry-run --Werror $(sources)
+
+clean:
+	rm -rf build

@@ -1,0 +1,131 @@
+// Measures the whole program, from start to exit, against the bounds that it has to keep. Takes the path of `cadrel` and
+// a folder for its files; fails when a bound is missed.
+
+#include "bench/BenchEdls.h"
+
+#include <fcntl.h>
+#include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <array>
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <exception>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+namespace {
+
+using namespace cadrel::bench;
+
+struct Measured {
+    double seconds;
+    double megabytes;
+};
+
+/// Runs a command with its output thrown away.
+Measured measure(const std::vector<std::string>& command)
+{
+    std::vector<char*> arguments;
+    for (const std::string& argument : command)
+        arguments.push_back(const_cast<char*>(argument.c_str()));
+    arguments.push_back(nullptr);
+
+    const auto start = std::chrono::steady_clock::now();
+    const pid_t child = fork();
+    if (child == 0) {
+        const int nowhere = open("/dev/null", O_WRONLY);
+        dup2(nowhere, STDOUT_FILENO);
+        execvp(arguments[0], arguments.data());
+        _exit(127);
+    }
+    int status = 0;
+    rusage usage{};
+    if (child < 0 || wait4(child, &status, 0, &usage) != child || status != 0)
+        throw std::runtime_error("Cannot measure " + command[0] + " " + command[1]);
+    const std::chrono::duration<double> taken = std::chrono::steady_clock::now() - start;
+    return {taken.count(), static_cast<double>(usage.ru_maxrss) * 1024 / 1e6};
+}
+
+constexpr std::size_t Runs = 7;
+
+double median(std::array<double, Runs> values)
+{
+    std::sort(values.begin(), values.end());
+    return values[Runs / 2];
+}
+
+/// The median times of two commands that take turns, so that a change of the machine's speed meets both.
+std::array<double, 2> compare(const std::vector<std::string>& a, const std::vector<std::string>& b)
+{
+    std::array<double, Runs> secondsA{};
+    std::array<double, Runs> secondsB{};
+    for (std::size_t run = 0; run < Runs; ++run) {
+        secondsA[run] = measure(a).seconds;
+        secondsB[run] = measure(b).seconds;
+    }
+    return {median(secondsA), median(secondsB)};
+}
+
+/// Prints a row; true when the bound is kept.
+bool report(const char* what, double value, double bound, const char* unit)
+{
+    const bool kept = value <= bound;
+    std::printf("%-60s %9.2f %-4s %9.2f %-4s %s\n", what, value, unit, bound, unit, kept ? "kept" : "MISSED");
+    return kept;
+}
+
+std::vector<std::string> generateCommand(const std::string& program, const std::filesystem::path& folder,
+                                         std::size_t shotCount)
+{
+    const std::string stem = (folder / std::to_string(shotCount)).string();
+    const Cut oldCut = makeCut(shotCount);
+    writeEdl(stem + "_old.edl", oldCut);
+    writeEdl(stem + "_new.edl", recut(oldCut, shotCount / 100));
+    return {program, "generate", "--old", stem + "_old.edl", "--new", stem + "_new.edl", "-o", stem + "_change.edl"};
+}
+
+bool run(const std::string& program, const std::filesystem::path& folder)
+{
+    std::filesystem::create_directories(folder);
+    const std::vector<std::string> small = generateCommand(program, folder, 10'000);
+    const std::vector<std::string> large = generateCommand(program, folder, 100'000);
+    const std::string listed = (folder / "100000_old.edl").string();
+    const std::string million = (folder / "1000000.edl").string();
+    writeEdl(million, makeCut(1'000'000));
+
+    const auto [listSeconds, wcSeconds] = compare({program, "list", listed, "--summary"}, {"wc", listed});
+    const auto [largeSeconds, smallSeconds] = compare(large, small);
+    const double megabytes = measure({program, "list", million, "--summary"}).megabytes;
+    std::filesystem::remove(million);
+
+    std::printf("%-60s %14s %14s\n", "the whole program, medians", "measured", "bound");
+    std::printf("%-60s %9.3f s\n", "wc of 100,000 events", wcSeconds);
+    std::printf("%-60s %9.3f s\n", "list --summary of 100,000 events", listSeconds);
+    std::printf("%-60s %9.3f s\n", "generate, 10,000 events, 100 changes", smallSeconds);
+    bool kept = report("list --summary against wc", listSeconds / wcSeconds, 3, "x");
+    kept &= report("generate, 100,000 events, 1,000 changes", largeSeconds, 1, "s");
+    kept &= report("generate, 100,000 events against 10,000", largeSeconds / smallSeconds, 14, "x");
+    kept &= report("list --summary of 1,000,000 events, most memory", megabytes, 900, "MB");
+    return kept;
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+    if (argc != 3) {
+        std::fprintf(stderr, "Usage: %s CADREL FOLDER\n", argv[0]);
+        return 2;
+    }
+    try {
+        return run(argv[1], argv[2]) ? EXIT_SUCCESS : EXIT_FAILURE;
+    } catch (const std::exception& failure) {
+        std::fprintf(stderr, "%s\n", failure.what());
+        return EXIT_FAILURE;
+    }
+}

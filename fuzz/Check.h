@@ -1,0 +1,17 @@
+#pragma once
+
+#include <cstdio>
+#include <cstdlib>
+
+namespace cadrel::fuzz {
+
+/// Ends the fuzzer, which then keeps its input, unless what the law says holds.
+inline void check(bool holds, const char* law)
+{
+    if (holds)
+        return;
+    std::fprintf(stderr, "Broken: %s\n", law);
+    std::abort();
+}
+
+} // namespace cadrel::fuzz
