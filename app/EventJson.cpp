@@ -3,42 +3,26 @@
 #include "core/EventList.h"
 #include "core/HealedEvent.h"
 
-#include <array>
-
 namespace cadrel::app {
 
 using core::EventBase;
 using core::HealedEvent;
-using core::TransitionType;
 using nlohmann::ordered_json;
 
 namespace {
 
-const char* wordFor(std::int32_t transitionType)
-{
-    switch (transitionType) {
-    case TransitionType::Dissolve:
-        return "dissolve";
-    case TransitionType::Wipe:
-        return "wipe";
-    default:
-        return "cut";
-    }
-}
-
 ordered_json toJson(const EventBase& event)
 {
     ordered_json members = ordered_json::array();
-    const auto* healed = dynamic_cast<const HealedEvent*>(&event);
-    if (healed != nullptr) {
+    if (const auto* healed = dynamic_cast<const HealedEvent*>(&event)) {
         for (const auto& member : healed->healedEvents().events())
             members.push_back(toJson(*member));
     }
     return {{"number", event.eventNumber()},
-            {"kind", healed == nullptr ? "plain" : "healed"},
+            {"kind", event.eventKind()},
             {"roll", event.rollName()},
             {"clip", event.clipName()},
-            {"transition", wordFor(event.transitionType())},
+            {"transition", event.transitionType()},
             {"duration", event.transitionDuration()},
             {"srcIn", event.srcIn().toString()},
             {"srcOut", event.srcOut().toString()},

@@ -12,9 +12,8 @@ namespace cadrel::app {
 
 /// Events as JSON for other programs: `{"events": [...]}`, and further keys behind it.
 ///
-/// The words for an event are those of its EDL: "kind" is "plain" or "healed", "transition" is "cut", "dissolve" or
-/// "wipe", "duration" its length in frames, "flaws" are the numbers of EventFlaw. Bytes that are no UTF-8 become
-/// U+FFFD.
+/// "kind" is 0 for a plain event and 1 for a healed one, "transition" 0 for a cut, 1 for a dissolve and 2 for a wipe,
+/// "duration" its length in frames, "flaws" are the numbers of EventFlaw. Bytes that are no UTF-8 become U+FFFD.
 class EventJson {
 public:
     using Events = std::span<const std::shared_ptr<core::EventBase>>;

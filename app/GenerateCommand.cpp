@@ -152,11 +152,14 @@ Failure failureOf(const DataModel& model, Result::Type result, const GenerateOpt
 }
 
 /// Fills the change list. Throws Failure, also when nothing survives.
-void generate(DataModel& model, const GenerateOptions& options)
+void generate(DataModel& model, const GenerateOptions& options, Terminal& terminal)
 {
+    terminal.showProgress("generating the change EDL");
     const Result::Type result = model.generateChangeEdl();
-    if (result != Result::Ok)
+    if (result != Result::Ok) {
+        terminal.showProgress("looking for the event on which it fails");
         throw failureOf(model, result, options);
+    }
     if (model.changeEdl().isEmpty())
         throw Failure{joined(inputsOf(options)),
                       "nothing of the old cut survives in the new one, so there is no change EDL",
@@ -300,8 +303,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     const std::vector<std::string> oldNames = loadSide(loader, options.oldFiles, model.oldEdl());
     const std::vector<std::string> newNames = loadSide(loader, options.newFiles, model.newEdl());
 
-    terminal.showProgress("generating the change EDL");
-    generate(model, options);
+    generate(model, options, terminal);
     const Report report{ProjectFramerate::labelOf(rate.getFramerate()),
                         rate.getFramerate(),
                         oldNames,

@@ -10,7 +10,6 @@
 namespace cadrel::app {
 
 using core::DataModel;
-using core::EventBase;
 using core::EventList;
 using core::Settings;
 

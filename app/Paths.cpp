@@ -81,9 +81,13 @@ Failure unwritable(const std::string& path)
         return {path, "the folder does not exist", "make it or give another"};
     if (!fs::is_directory(folder, error))
         return {path, "what should be the folder is a file", "give another name"};
-    if (access(folder.c_str(), W_OK) != 0)
+    const bool exists = fs::exists(path, error);
+    if (exists && access(path.c_str(), W_OK) != 0)
+        return {path, "is protected against writing", "give another name"};
+    const bool isReplaced = !exists || fs::is_regular_file(path, error);
+    if (isReplaced && access(folder.c_str(), W_OK) != 0)
         return {path, "you may not write into the folder", "give another folder"};
-    return {path, "can't be written", "see whether the disk is full or the file protected"};
+    return {path, "can't be written", "see whether the disk is full"};
 }
 
 } // namespace cadrel::app

@@ -3,27 +3,33 @@
 #include "core/ChangeContextListenerInterface.h"
 
 #include <algorithm>
-#include <functional>
 
 namespace cadrel::core {
 
 void ChangeContextNotificationBase::addListener(ChangeContextListenerInterface* listener)
 {
-    const auto place = std::lower_bound(listeners_.begin(), listeners_.end(), listener, std::less<>());
-    if (place == listeners_.end() || *place != listener)
-        listeners_.insert(place, listener);
+    const bool isThere = listener == first_ || std::find(others_.begin(), others_.end(), listener) != others_.end();
+    if (isThere)
+        return;
+    if (first_ == nullptr)
+        first_ = listener;
+    else
+        others_.push_back(listener);
 }
 
 void ChangeContextNotificationBase::removeListener(ChangeContextListenerInterface* listener)
 {
-    const auto place = std::lower_bound(listeners_.begin(), listeners_.end(), listener, std::less<>());
-    if (place != listeners_.end() && *place == listener)
-        listeners_.erase(place);
+    if (listener == first_)
+        first_ = nullptr;
+    else
+        std::erase(others_, listener);
 }
 
 void ChangeContextNotificationBase::notify(const ChangeContext& context)
 {
-    for (ChangeContextListenerInterface* listener : listeners_)
+    if (first_ != nullptr)
+        first_->onChange(context);
+    for (ChangeContextListenerInterface* listener : others_)
         listener->onChange(context);
 }
 

@@ -25,8 +25,9 @@ public:
     virtual void notify(const ChangeContext& context);
 
 private:
-    // A set, kept as a sorted vector: there is one for each of a million events, and most hold a single pointer.
-    std::vector<ChangeContextListenerInterface*> listeners_;
+    // A set. Of a million events most have the one list as their listener, which takes no further memory.
+    ChangeContextListenerInterface* first_ = nullptr;
+    std::vector<ChangeContextListenerInterface*> others_;
 };
 
 } // namespace cadrel::core

@@ -197,7 +197,7 @@ void expectUnwritable(const std::string& path, const std::string& problem)
 
 TEST(BadOutput, AFullDisk)
 {
-    expectUnwritable("/dev/full", "can't be written; see whether the disk is full or the file protected");
+    expectUnwritable("/dev/full", "can't be written; see whether the disk is full");
 }
 
 TEST(BadOutput, AFolderThatDoesNotExist)
@@ -224,8 +224,20 @@ TEST(BadOutput, AFolderThatTakesNoFiles)
     const std::string path = "/proc/change.edl";
     const bool mayWrite = access("/proc", W_OK) == 0; // root is not held back by rights, but the system is
 
-    expectUnwritable(path, mayWrite ? "can't be written; see whether the disk is full or the file protected"
+    expectUnwritable(path, mayWrite ? "can't be written; see whether the disk is full"
                                     : "you may not write into the folder; give another folder");
+}
+
+TEST(BadOutput, AFileProtectedAgainstWriting)
+{
+    if (geteuid() == 0)
+        GTEST_SKIP() << "root may write everything";
+    const TempFolder folder;
+    const std::string file = folder.write("change.edl", "former list");
+    std::filesystem::permissions(file, std::filesystem::perms::owner_read);
+
+    expectUnwritable(file, "is protected against writing; give another name");
+    EXPECT_EQ(contentOf(file), "former list");
 }
 
 TEST(BadOutput, AFormerFileStaysWhenTheRunFails)

@@ -75,12 +75,12 @@ TEST(List, JsonHasExactlyTheKeysOfAnEvent)
     const json events = listAsJson({file}).at("events");
 
     ASSERT_EQ(events.size(), 4U);
-    EXPECT_EQ(events[2], json::parse(R"({"number": 2, "kind": "plain", "roll": "A002", "clip": "TWO",
-        "transition": "dissolve", "duration": 12, "srcIn": "11:00:00:00", "srcOut": "11:00:02:00",
+    EXPECT_EQ(events[2], json::parse(R"({"number": 2, "kind": 0, "roll": "A002", "clip": "TWO",
+        "transition": 1, "duration": 12, "srcIn": "11:00:00:00", "srcOut": "11:00:02:00",
         "dstIn": "01:00:04:00", "dstOut": "01:00:06:00", "speed": 1.0, "vfx": false, "flaws": [],
         "edlFile": "film.edl", "members": []})"));
-    EXPECT_EQ(events[3], json::parse(R"({"number": 3, "kind": "plain", "roll": "A003", "clip": "",
-        "transition": "cut", "duration": 0, "srcIn": "12:00:00:00", "srcOut": "12:00:04:12",
+    EXPECT_EQ(events[3], json::parse(R"({"number": 3, "kind": 0, "roll": "A003", "clip": "",
+        "transition": 0, "duration": 0, "srcIn": "12:00:00:00", "srcOut": "12:00:04:12",
         "dstIn": "01:00:06:00", "dstOut": "01:00:08:06", "speed": 2.0, "vfx": false, "flaws": [4],
         "edlFile": "film.edl", "members": []})"));
 }
