@@ -3,26 +3,36 @@
 #include "core/ChangeContextListenerInterface.h"
 
 #include <algorithm>
+#include <functional>
+#include <utility>
 
 namespace cadrel::core {
 
 void ChangeContextNotificationBase::addListener(ChangeContextListenerInterface* listener)
 {
-    const bool isThere = listener == first_ || std::find(others_.begin(), others_.end(), listener) != others_.end();
-    if (isThere)
+    if (listener == first_)
         return;
-    if (first_ == nullptr)
+    if (first_ == nullptr) {
         first_ = listener;
-    else
-        others_.push_back(listener);
+        return;
+    }
+    if (std::less<>()(listener, first_))
+        std::swap(listener, first_);
+    const auto place = std::lower_bound(others_.begin(), others_.end(), listener, std::less<>());
+    if (place == others_.end() || *place != listener)
+        others_.insert(place, listener);
 }
 
 void ChangeContextNotificationBase::removeListener(ChangeContextListenerInterface* listener)
 {
-    if (listener == first_)
-        first_ = nullptr;
-    else
+    if (listener != first_) {
         std::erase(others_, listener);
+    } else if (others_.empty()) {
+        first_ = nullptr;
+    } else {
+        first_ = others_.front();
+        others_.erase(others_.begin());
+    }
 }
 
 void ChangeContextNotificationBase::notify(const ChangeContext& context)

@@ -25,8 +25,9 @@ public:
     virtual void notify(const ChangeContext& context);
 
 private:
-    // A set. Of a million events most have the one list as their listener, which takes no further memory.
-    ChangeContextListenerInterface* first_ = nullptr;
+    // A set in the order of the addresses. Of a million events most have the one list as their listener, which takes no
+    // further memory.
+    ChangeContextListenerInterface* first_ = nullptr; ///< null when there is none at all
     std::vector<ChangeContextListenerInterface*> others_;
 };
 
