@@ -6,6 +6,8 @@
 
 #include <algorithm>
 #include <cmath>
+#include <iterator>
+#include <span>
 
 namespace cadrel::core {
 
@@ -15,13 +17,6 @@ namespace {
 
 constexpr double NormalSpeed = 1.0;
 constexpr double FreezeSpeed = 0.0;
-constexpr double SpeedTolerance = 0.01;
-
-bool isNear(double speed, double expected)
-{
-    return std::fabs(speed - expected) < SpeedTolerance;
-}
-
 } // namespace
 
 /// What a new event shares with a group of twins, in frames. It is the same for every twin but for the place.
@@ -74,11 +69,11 @@ private:
         stretch.offsetOld = start - old.srcIn;
         stretch.offsetNew = start - shape_.srcIn;
         stretch.length = std::min(old.srcOut, shape_.srcOut) - start;
-        if (isNear(old.motionSpeed, FreezeSpeed)) {
+        if (EventBase::areSameSpeed(old.motionSpeed, FreezeSpeed)) {
             // The one picture stands still, so the stretch begins where the events begin.
             stretch.length = std::min(old.dstOut - old.dstIn, shape_.dstOut - shape_.dstIn);
         } else {
-            if (!isNear(old.motionSpeed, NormalSpeed)) {
+            if (!EventBase::areSameSpeed(old.motionSpeed, NormalSpeed)) {
                 stretch.length = toProgrammeTime(stretch.length, old.motionSpeed);
                 stretch.offsetOld = toProgrammeTime(stretch.offsetOld, old.motionSpeed);
                 stretch.offsetNew = toProgrammeTime(stretch.offsetNew, old.motionSpeed);
@@ -101,13 +96,11 @@ private:
 
     void checkWithinDay(const SharedStretch& stretch) const
     {
-        const std::int32_t lastPlace = stretch.group->places.back().dstIn;
-        for (const std::int64_t start :
-             {std::int64_t{lastPlace} + stretch.startInOld, std::int64_t{shape_.dstIn} + stretch.startInNew,
-              std::int64_t{shape_.srcIn} + stretch.offsetNew}) {
-            if (start + stretch.length > framerate_.lastFrame)
-                throw Result::OutOfRange;
-        }
+        const std::int32_t lastPlace = stretch.group->placesByTime.back().dstIn;
+        const std::int32_t latestStart =
+            std::max({lastPlace + stretch.startInOld, shape_.dstIn + stretch.startInNew, stretch.newSourceStart});
+        if (latestStart + stretch.length > framerate_.lastFrame)
+            throw Result::OutOfRange;
     }
 
     /// Stretches that overlap, directly or through others, are decided between by themselves.
@@ -120,7 +113,7 @@ private:
         for (const SharedStretch& stretch : stretches_) {
             if (stretch.length == 0) {
                 // An empty stretch overlaps nothing.
-                for (const TwinGroup::Place& place : stretch.group->places)
+                for (const TwinGroup::Place& place : stretch.group->placesByIndex)
                     survivors_.push_back({&stretch, place});
                 continue;
             }
@@ -157,14 +150,14 @@ private:
         for (const SharedStretch* stretch : overlapping) {
             if (stretch->length != longest)
                 continue;
-            const Survivor nearest{stretch, nearestPlace(*stretch)};
+            const Survivor nearest{stretch, nearestPlace(*stretch, stretch->group->placesByTime)};
             if (best.stretch == nullptr || isNearer(nearest, best))
                 best = nearest;
         }
         return best;
     }
 
-    /// The later in the list wins a tie.
+    /// Of candidates of one length; the later in the list wins a tie. CandidateStretch::beatsLater says the same.
     bool isNearer(const Survivor& a, const Survivor& b) const
     {
         const double aDistance = distance(*a.stretch, a.place.dstIn);
@@ -173,10 +166,9 @@ private:
     }
 
     /// The displacement falls as the old place rises, so the nearest to the last one stands on either side of where it
-    /// falls below that.
-    TwinGroup::Place nearestPlace(const SharedStretch& stretch) const
+    /// falls below that. `places` ascends by time and is not empty.
+    TwinGroup::Place nearestPlace(const SharedStretch& stretch, std::span<const TwinGroup::Place> places) const
     {
-        const auto places = stretch.group->places;
         const auto below = std::partition_point(places.begin(), places.end(), [&](const TwinGroup::Place& place) {
             return displacement(stretch, place.dstIn) >= lastDisplacement_;
         });
@@ -191,21 +183,64 @@ private:
         return isNearer(nearestAbove, nearestBelow) ? nearestAbove.place : nearestBelow.place;
     }
 
+    /// Walks through the candidates in list order. Twins with no other candidate between them overlap each other and
+    /// the same others, so that the best of such a run stands for all of it.
     void addSurvivorsOfWalk(const std::vector<const SharedStretch*>& connected)
     {
-        std::vector<Survivor> all;
-        for (const SharedStretch* stretch : connected) {
-            for (const TwinGroup::Place& place : stretch->group->places)
-                all.push_back({stretch, place});
-        }
-        std::sort(all.begin(), all.end(),
-                  [](const Survivor& a, const Survivor& b) { return a.place.index < b.place.index; });
+        const std::vector<Survivor> runs = bestOfRuns(connected);
         std::vector<CandidateStretch> candidates;
-        candidates.reserve(all.size());
-        for (const auto& [stretch, place] : all)
+        candidates.reserve(runs.size());
+        for (const auto& [stretch, place] : runs)
             candidates.push_back({stretch->newSourceStart, stretch->newSourceEnd, distance(*stretch, place.dstIn)});
         for (const std::size_t place : survivorsOfOverlaps(candidates))
-            survivors_.push_back(all[place]);
+            survivors_.push_back(runs[place]);
+    }
+
+    /// In list order.
+    std::vector<Survivor> bestOfRuns(const std::vector<const SharedStretch*>& connected) const
+    {
+        struct Rest {
+            const SharedStretch* stretch;
+            std::span<const TwinGroup::Place> places;
+        };
+        const auto comesLater = [](const Rest& a, const Rest& b) {
+            return a.places.front().index > b.places.front().index;
+        };
+        std::vector<Rest> rests;
+        for (const SharedStretch* stretch : connected)
+            rests.push_back({stretch, stretch->group->placesByIndex});
+        std::make_heap(rests.begin(), rests.end(), comesLater);
+
+        std::vector<Survivor> best;
+        while (!rests.empty()) {
+            std::pop_heap(rests.begin(), rests.end(), comesLater);
+            const Rest rest = rests.back();
+            rests.pop_back();
+            const auto runEnd =
+                rests.empty() ? rest.places.end()
+                              : std::partition_point(rest.places.begin(), rest.places.end(), [&](const auto& place) {
+                                    return place.index < rests.front().places.front().index;
+                                });
+            const auto runLength = static_cast<std::size_t>(runEnd - rest.places.begin());
+            best.push_back(bestOfRun(*rest.stretch, rest.places.first(runLength)));
+            if (runLength < rest.places.size()) {
+                rests.push_back({rest.stretch, rest.places.subspan(runLength)});
+                std::push_heap(rests.begin(), rests.end(), comesLater);
+            }
+        }
+        return best;
+    }
+
+    Survivor bestOfRun(const SharedStretch& stretch, std::span<const TwinGroup::Place> run) const
+    {
+        if (stretch.group->areOrdersEqual)
+            return {&stretch, nearestPlace(stretch, run)};
+        Survivor best{&stretch, run.front()};
+        for (const TwinGroup::Place& place : run.subspan(1)) {
+            if (isNearer({&stretch, place}, best))
+                best.place = place;
+        }
+        return best;
     }
 
     double seconds(std::int32_t frames) const { return frames / framerate_.rate; }
@@ -237,7 +272,7 @@ private:
         change.setClipName(event_.clipName());
         change.setRollName(event_.rollName());
         change.setVfx(event_.vfx());
-        if (old.transitionType == TransitionType::Dissolve || old.transitionType == TransitionType::Wipe)
+        if (TransitionType::takesTime(old.transitionType))
             change.setTransitionType(old.transitionType);
         const std::int32_t srcIn = survivor.place.dstIn + stretch.startInOld;
         const std::int32_t dstIn = shape_.dstIn + stretch.startInNew;

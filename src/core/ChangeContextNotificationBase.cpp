@@ -37,10 +37,17 @@ void ChangeContextNotificationBase::removeListener(ChangeContextListenerInterfac
 
 void ChangeContextNotificationBase::notify(const ChangeContext& context)
 {
-    if (first_ != nullptr)
-        first_->onChange(context);
-    for (ChangeContextListenerInterface* listener : others_)
+    for (ChangeContextListenerInterface* listener = first_; listener != nullptr; listener = listenerBehind(listener))
         listener->onChange(context);
+}
+
+ChangeContextListenerInterface*
+ChangeContextNotificationBase::listenerBehind(const ChangeContextListenerInterface* listener) const
+{
+    if (first_ != nullptr && std::less<>()(listener, first_))
+        return first_;
+    const auto place = std::upper_bound(others_.begin(), others_.end(), listener, std::less<>());
+    return place == others_.end() ? nullptr : *place;
 }
 
 } // namespace cadrel::core

@@ -25,6 +25,9 @@ public:
     virtual void notify(const ChangeContext& context);
 
 private:
+    /// The listener with the next greater address, whoever has been added or removed since; null behind the last.
+    ChangeContextListenerInterface* listenerBehind(const ChangeContextListenerInterface* listener) const;
+
     // A set in the order of the addresses. Of a million events most have the one list as their listener, which takes no
     // further memory.
     ChangeContextListenerInterface* first_ = nullptr; ///< null when there is none at all

@@ -4,10 +4,11 @@
 #include "core/CutMap.h"
 #include "core/EventBase.h"
 #include "core/EventList.h"
-#include "core/Settings.h"
+#include "core/MatchBy.h"
 #include "core/TransitionPieces.h"
 
 #include <memory>
+#include <utility>
 
 namespace cadrel::core {
 
@@ -21,7 +22,7 @@ void ChangeEdlGenerator::configure(std::int32_t matchBy, const std::vector<VfxPa
 
 ChangeEdlGenerator::ComparisonName ChangeEdlGenerator::comparisonName(const EventBase& event) const
 {
-    const std::string& raw = matchBy_ == MatchBy::ClipName ? event.clipName() : event.rollName();
+    const std::string& raw = nameBy(matchBy_, event);
     std::string key = versionPatterns_.stripVersion(raw);
     const bool isVfx = key != raw;
     return {std::move(key), isVfx};

@@ -47,7 +47,7 @@ bool isInside(double time, const SecondsRange& range)
 
 bool shareMoreThanAPoint(const SecondsRange& a, const SecondsRange& b)
 {
-    return a.start < b.end && b.start < a.end;
+    return std::max(a.start, b.start) < std::min(a.end, b.end);
 }
 
 /// What remains of `range` around `covered`.
@@ -90,7 +90,7 @@ std::vector<SecondsRange> uncoveredRanges(const SecondsRange& range, const WeakE
 
 } // namespace
 
-CutMap::CutMap(const EventList& events, const Framerate& framerate) : framerate_(framerate)
+CutMap::CutMap(const EventList& events, const Framerate& framerate)
 {
     held_.reserve(events.size());
     for (const auto& event : events.events()) {
@@ -103,10 +103,10 @@ CutMap::CutMap(const EventList& events, const Framerate& framerate) : framerate_
     heldByAddress_.reserve(held_.size());
     for (std::uint32_t index = 0; index < held_.size(); ++index) {
         const EventBase& event = *held_[index];
-        sourceEdges_.push_back({event.srcIn().toSeconds(framerate_), index});
-        sourceEdges_.push_back({event.srcOut().toSeconds(framerate_), index});
-        destinationEdges_.push_back({event.dstIn().toSeconds(framerate_), index});
-        destinationEdges_.push_back({event.dstOut().toSeconds(framerate_), index});
+        sourceEdges_.push_back({event.srcIn().toSeconds(framerate), index});
+        sourceEdges_.push_back({event.srcOut().toSeconds(framerate), index});
+        destinationEdges_.push_back({event.dstIn().toSeconds(framerate), index});
+        destinationEdges_.push_back({event.dstOut().toSeconds(framerate), index});
         heldByAddress_.push_back(&event);
     }
     const auto isEarlier = [](const Edge& a, const Edge& b) { return a.seconds < b.seconds; };

@@ -45,12 +45,13 @@ public:
     std::vector<std::weak_ptr<EventBase>> eventsInSourceRange(double start, double end) const;
     std::vector<std::weak_ptr<EventBase>> eventsInDestinationRange(double start, double end) const;
 
-    /// The parts of a range that no event covers, in the order in which they arise. Throw Result::InvalidArgument where
-    /// an event ends before it starts.
+    /// The parts of a range that no event covers, in ascending order, under the provider's rate. Throw
+    /// Result::InvalidArgument where an event ends before it starts, and what Timecode::toSeconds throws.
     std::vector<SecondsRange> uncoveredSourceRanges(const SecondsRange& range) const;
     std::vector<SecondsRange> uncoveredDestinationRanges(const SecondsRange& range) const;
 
-    /// Whether one of the events that eventsInDestinationRange answers covers the whole range.
+    /// Whether one of the events that eventsInDestinationRange answers covers the whole range, under the provider's
+    /// rate; throws what Timecode::toSeconds throws.
     bool isDestinationRangeInsideAnEvent(const SecondsRange& range) const;
 
 private:
@@ -62,7 +63,6 @@ private:
     static SecondsRange span(const std::vector<Edge>& edges);
     std::vector<std::weak_ptr<EventBase>> eventsInRange(const std::vector<Edge>& edges, double start, double end) const;
 
-    Framerate framerate_;
     std::vector<Edge> sourceEdges_;
     std::vector<Edge> destinationEdges_;
     std::vector<CutEntry> byDstIn_;

@@ -173,9 +173,14 @@ EventList DataModel::eventsOf(const EventList& programme, const Timecode& in, co
 void DataModel::revalidateEvents()
 {
     stopListening();
-    for (const EventList* list : {&oldEdl_, &newEdl_, &changeEdl_}) {
-        for (const auto& event : list->events())
-            event->revalidate();
+    try {
+        for (const EventList* list : {&oldEdl_, &newEdl_, &changeEdl_}) {
+            for (const auto& event : list->events())
+                event->revalidate();
+        }
+    } catch (...) {
+        startListening();
+        throw;
     }
     startListening();
     send(DataModelChangeContext(this));
@@ -237,7 +242,7 @@ void DataModel::readOlder(ByteArchive& archive, std::uint32_t version)
     } catch (...) {
         result = Result::NotAvailable;
     }
-    finishReading(result, true);
+    finishReading(result, result == Result::Ok || !restoring_);
 }
 
 void DataModel::finishReading(Result::Type result, bool notifies)

@@ -92,8 +92,8 @@ public:
     void revalidateEvents();
     /// The state of a fresh model, except that listeners stay and the pattern rows keep their content.
     void reset();
-    /// Reads a snapshot without touching the settings and sends a DataModelChangeContext. A failure empties the rest
-    /// of the model and is thrown on.
+    /// Reads a snapshot without touching the settings and sends a DataModelChangeContext. A failure is thrown on; it
+    /// empties the rest of the model, unless the snapshot's version number already can't be read or is a newer one.
     void restore(serialize::ByteArchive& archive);
 
     /// Forwards the context to the notifier.
@@ -101,7 +101,7 @@ public:
 
     /// The readers empty the model on a failure and throw behind the one DataModelChangeContext that they send:
     /// readCurrent what the members throw, readOlder Result::UnknownVersion, and both Result::NotAvailable for what is
-    /// none of the system's own values. readCurrent sends nothing during `restore`.
+    /// none of the system's own values. During `restore` readCurrent sends nothing, nor does a failing readOlder.
     void readCurrent(serialize::ByteArchive& archive) override;
     void write(serialize::ByteArchive& archive) const override;
     void readOlder(serialize::ByteArchive& archive, std::uint32_t version) override;

@@ -111,9 +111,9 @@ std::string EventBase::flawsText() const
     return text;
 }
 
-bool EventBase::hasSpeed(double speed) const
+bool EventBase::areSameSpeed(double a, double b)
 {
-    return std::fabs(motionSpeed_ - speed) < SpeedTolerance;
+    return std::fabs(a - b) < SpeedTolerance;
 }
 
 bool EventBase::hasSameTimecodes(const EventBase& other) const
@@ -275,6 +275,9 @@ void EventBase::updateFlaws(bool timecodesValid)
 
 void EventBase::updateMotionSpeed(const Framerate& framerate)
 {
+    // Frames can't be counted at a rate that isn't known to be non-drop, except at 30 frames.
+    if (framerate.dropFrame != 0 && framerate.framesPerSecond != 30)
+        return;
     if (srcOut_ == srcIn_) {
         motionSpeed_ = dstOut_ == dstIn_ ? 1.0 : 0.0;
         return;

@@ -43,12 +43,17 @@ struct EventKind {
 
 struct TransitionType {
     enum Type : std::int32_t { Cut = 0, Dissolve = 1, Wipe = 2 };
+
+    /// True for a dissolve and a wipe.
+    static constexpr bool takesTime(std::int32_t type) { return type == Dissolve || type == Wipe; }
 };
 
 /// One event of an edit decision list: a stretch of source material, the place in the programme where it plays, a
 /// transition and a few names. It keeps track of its own flaws and of its motion speed, both of which follow from the
 /// four timecodes under the provider's rate. Setters of timecodes therefore throw Result::NotAvailable without a
 /// FramerateProvider.
+///
+/// The getters return references, which follow the changes of the event: copy what has to outlive a setter.
 ///
 /// Every setter notifies with the event's own context after the change, except setEventNumber, setComment, addFlaw and
 /// removeFlaw, which are called in bulk or before anyone listens.
@@ -78,6 +83,8 @@ public:
     /// A set, in ascending order.
     std::vector<std::int32_t> flaws() const { return flaws_.values(); }
     std::int32_t transitionType() const { return transitionType_; }
+    /// True for a dissolve and a wipe.
+    bool isTransition() const { return TransitionType::takesTime(transitionType_); }
     /// In frames.
     std::int32_t transitionDuration() const { return transitionDuration_; }
     const std::string& reservedText() const { return reservedText_; }
@@ -95,8 +102,9 @@ public:
     bool hasFormatFlaw() const;
     /// The messages of all flaws, translated, a line each. Throws Result::NotAvailable without a string converter.
     std::string flawsText() const;
-    /// True when `speed` is closer than 0.01 to the motion speed.
-    bool hasSpeed(double speed) const;
+    /// Speeds that are closer than 0.01 count as one.
+    static bool areSameSpeed(double a, double b);
+    bool hasSpeed(double speed) const { return areSameSpeed(motionSpeed_, speed); }
     bool isNormalSpeed() const { return hasSpeed(1.0); }
     bool hasSameTimecodes(const EventBase& other) const;
 

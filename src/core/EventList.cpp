@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <array>
+#include <iterator>
 #include <map>
 #include <unordered_set>
 #include <utility>
@@ -69,8 +70,10 @@ EventList& EventList::operator=(const EventList& other)
 {
     if (this == &other)
         return *this;
+    // The other list may live in one of the own events, a healed one, which ends with them.
+    Events shared = other.events_;
     stopListening();
-    events_ = other.events_;
+    std::swap(events_, shared);
     listen();
     notifyListeners();
     return *this;
@@ -124,18 +127,27 @@ TimecodeRange EventList::range(ListSide side) const
     return {low, high};
 }
 
-void EventList::add(const std::shared_ptr<EventBase>& event)
+void EventList::add(std::shared_ptr<EventBase> event)
 {
+    if (!event)
+        throw Result::InvalidArgument;
     event->addListener(this);
-    events_.push_back(event);
+    events_.push_back(std::move(event));
     notifyListeners();
 }
 
 void EventList::append(const EventList& other)
 {
-    const Events added = other.events_;
+    append(Events(other.events_));
+}
+
+void EventList::append(Events events)
+{
     stopListening();
-    events_.insert(events_.end(), added.begin(), added.end());
+    if (events_.empty())
+        events_ = std::move(events);
+    else
+        events_.insert(events_.end(), std::move_iterator(events.begin()), std::move_iterator(events.end()));
     listen();
     notifyListeners();
 }
@@ -146,11 +158,7 @@ void EventList::append(const EventList& other, std::size_t first, std::size_t co
         return;
     checkRange(first, count, other.size());
     const auto start = other.events_.begin() + static_cast<std::ptrdiff_t>(first);
-    const Events added(start, start + static_cast<std::ptrdiff_t>(count));
-    stopListening();
-    events_.insert(events_.end(), added.begin(), added.end());
-    listen();
-    notifyListeners();
+    append(Events(start, start + static_cast<std::ptrdiff_t>(count)));
 }
 
 void EventList::erase(std::size_t first, std::size_t count)

@@ -64,10 +64,10 @@ public:
     TimecodeRange sourceRange() const { return range(ListSide::Source); }
     TimecodeRange destinationRange() const { return range(ListSide::Destination); }
 
-    void add(const std::shared_ptr<EventBase>& event);
+    /// Throws Result::InvalidArgument for null; no event of a list is ever null.
+    void add(std::shared_ptr<EventBase> event);
     /// Shares all events of `other`, which may be this list.
     void append(const EventList& other);
-    /// Takes over events that no list has listened to.
     void append(std::vector<std::shared_ptr<EventBase>> events);
     /// Shares `count` events of `other` from `first`. A count of 0 does nothing and sends nothing. Throws
     /// Result::OutOfRange when they pass the end of `other`.
@@ -113,7 +113,8 @@ public:
 
     /// Undoes earlier healing of the selected events and heals them anew by `healMode` (Settings::HealMode) against
     /// the inserts of `referenceList`. The list is sorted by DST IN and numbered from 1 afterwards, the healed events
-    /// named by their order. Throws what HealProcessing throws; no event is lost then.
+    /// named by their order. Members of a healed event whose timecodes have become invalid are kept as they are. Throws
+    /// what HealProcessing throws; no event is lost then.
     void heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode);
     /// Whether `heal` would change the number of events. Changes nothing. False for a selection with gaps in this list.
     bool canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const;

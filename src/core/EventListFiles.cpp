@@ -5,9 +5,8 @@
 #include "util/Result.h"
 
 #include <algorithm>
-#include <iterator>
+#include <string>
 #include <unordered_set>
-#include <utility>
 
 namespace cadrel::core {
 
@@ -42,17 +41,6 @@ void renameBRollsOf(const EventList& list)
 }
 
 } // namespace
-
-void EventList::append(std::vector<std::shared_ptr<EventBase>> events)
-{
-    stopListening();
-    if (events_.empty())
-        events_ = std::move(events);
-    else
-        events_.insert(events_.end(), std::move_iterator(events.begin()), std::move_iterator(events.end()));
-    listen();
-    notifyListeners();
-}
 
 void EventList::load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
                      bool acceptAudioChannels)

@@ -23,16 +23,18 @@ namespace {
 /// members.
 EventList withoutHealing(const EventList& events, const CutMap& selected)
 {
-    EventList taken;
+    std::vector<std::shared_ptr<EventBase>> taken;
     for (const auto& event : events.events()) {
         if (!selected.contains(event))
             continue;
         if (const auto healed = std::dynamic_pointer_cast<HealedEvent>(event))
-            taken.append(healed->healedEvents());
+            taken.insert(taken.end(), healed->healedEvents().events().begin(), healed->healedEvents().events().end());
         else
-            taken.add(event);
+            taken.push_back(event);
     }
-    return taken;
+    EventList list;
+    list.append(std::move(taken));
+    return list;
 }
 
 /// Takes the events out whose timecodes are invalid, which healing would drop.

@@ -27,9 +27,8 @@ bool setVfxFlags(const std::vector<std::shared_ptr<EventBase>>& events, Predicat
 void EventList::markVfx(const VfxNameMatcher& patterns, std::int32_t matchBy)
 {
     stopListening();
-    const bool changed = setVfxFlags(events_, [&](const EventBase& event) {
-        return patterns.hasVersion(matchBy == MatchBy::ClipName ? event.clipName() : event.rollName());
-    });
+    const bool changed =
+        setVfxFlags(events_, [&](const EventBase& event) { return patterns.hasVersion(nameBy(matchBy, event)); });
     listen();
     if (changed)
         notifyListeners();

@@ -1,6 +1,7 @@
 #include "core/Framerate.h"
 
 #include "core/Timecode.h"
+#include "util/Result.h"
 
 #include <array>
 
@@ -60,6 +61,8 @@ double Framerate::pullDownFactor()
 
 void Framerate::updateLastFrame()
 {
+    if (framesPerSecond < 0)
+        throw util::Result::OutOfRange;
     lastFrame = framesPerSecond == 0 ? 0 : Timecode(23, 59, 59, framesPerSecond - 1).toFrameCount(*this);
 }
 

@@ -12,7 +12,8 @@ struct Framerate {
     /// `rate` is the whole nominal number. Throws Result::NotSupported for drop-frame at a nominal rate other than 30.
     Framerate(std::int32_t nominalRate, std::int32_t dropFrameState);
     /// `rate` is the nominal number times the pull-down factor when pulled down. Throws Result::NotSupported for
-    /// drop-frame, or an unknown drop-frame state, at a nominal rate other than 30.
+    /// drop-frame, or an unknown drop-frame state, at a nominal rate other than 30, and Result::OutOfRange for a rate
+    /// at which a day's frames can't be counted.
     Framerate(std::int32_t nominalRate, bool isPulledDown, std::int32_t dropFrameState);
 
     /// The rate of a label such as "29.97 dfps"; the whole label has to match. Any other label gives a rate with
@@ -24,7 +25,8 @@ struct Framerate {
 
     bool isUnknown() const { return framesPerSecond == 0 || dropFrame == -1; }
 
-    /// Computes `lastFrame` anew from the other fields.
+    /// Computes `lastFrame` anew from the other fields; 0 without a nominal rate. Throws as the constructor from three
+    /// numbers.
     void updateLastFrame();
 
     std::int32_t framesPerSecond = 0; ///< nominal whole rate; 0 is unknown

@@ -52,7 +52,7 @@ HealedEvent::~HealedEvent()
     }
 }
 
-void HealedEvent::addEvent(const std::shared_ptr<EventBase>& event)
+void HealedEvent::addEvent(std::shared_ptr<EventBase> event)
 {
     healedEvents_.add(event);
     if (event->vfx())
@@ -65,14 +65,12 @@ void HealedEvent::addEvent(const std::shared_ptr<EventBase>& event)
 
 void HealedEvent::readCurrent(ByteArchive& archive)
 {
-    const NestingGuard guard;
-    readFields(archive, version());
-    archive >> healedEvents_;
-    finishReading();
+    readMembers(archive, version());
 }
 
 void HealedEvent::write(ByteArchive& archive) const
 {
+    // What couldn't be read back is not written either.
     const NestingGuard guard;
     EventBase::write(archive);
     archive << healedEvents_;
@@ -82,6 +80,11 @@ void HealedEvent::readOlder(ByteArchive& archive, std::uint32_t version)
 {
     if (version >= this->version())
         throw Result::UnknownVersion;
+    readMembers(archive, version);
+}
+
+void HealedEvent::readMembers(ByteArchive& archive, std::uint32_t version)
+{
     const NestingGuard guard;
     readFields(archive, version);
     archive >> healedEvents_;

@@ -18,7 +18,7 @@ public:
     ~HealedEvent() override;
 
     /// Adds a member, shared, and widens this event over it, without a notification of this event.
-    void addEvent(const std::shared_ptr<EventBase>& event);
+    void addEvent(std::shared_ptr<EventBase> event);
     EventList& healedEvents() { return healedEvents_; }
     const EventList& healedEvents() const { return healedEvents_; }
 
@@ -28,7 +28,7 @@ public:
     void readOlder(serialize::ByteArchive& archive, std::uint32_t version) override;
 
 private:
-    void readMembers(serialize::ByteArchive& archive);
+    void readMembers(serialize::ByteArchive& archive, std::uint32_t version);
 
     EventList healedEvents_;
 };

@@ -3,7 +3,6 @@
 #include "core/EventBase.h"
 
 #include <algorithm>
-#include <cmath>
 #include <limits>
 #include <numeric>
 #include <tuple>
@@ -11,8 +10,6 @@
 namespace cadrel::core {
 
 namespace {
-
-constexpr double SpeedTolerance = 0.01;
 
 /// All that twins have in common. The destination length follows from speed and source but for rounding, and decides
 /// over freeze frames.
@@ -34,12 +31,14 @@ EventShape::EventShape(const EventBase& event, const Framerate& framerate)
 
 bool EventShape::isPlayedLike(const EventShape& other) const
 {
-    return std::fabs(motionSpeed - other.motionSpeed) < SpeedTolerance && transitionType == other.transitionType &&
+    return EventBase::areSameSpeed(motionSpeed, other.motionSpeed) && transitionType == other.transitionType &&
            transitionDuration == other.transitionDuration;
 }
 
 void MaterialIndex::add(const std::string& name, const EventShape& shape, std::size_t index)
 {
+    if (shape.srcIn >= shape.srcOut)
+        return;
     const std::size_t material = materialByName_.try_emplace(name, materialByName_.size()).first->second;
     added_.push_back({material, shape, index});
 }
@@ -62,22 +61,36 @@ void MaterialIndex::finish()
 void MaterialIndex::makeGroups()
 {
     materials_.resize(materialByName_.size());
-    places_.reserve(added_.size());
-    const AddedEvent* previous = nullptr;
-    for (const AddedEvent& event : added_) {
-        Material& material = materials_[event.material];
-        const bool opensMaterial = previous == nullptr || previous->material != event.material;
-        const bool opensGroup = opensMaterial || twinKeyOf(previous->shape) != twinKeyOf(event.shape);
-        if (opensMaterial)
+    placesByTime_.reserve(added_.size());
+    for (const AddedEvent& event : added_)
+        placesByTime_.push_back({event.shape.dstIn, event.index});
+    placesByIndex_ = placesByTime_;
+
+    for (std::size_t first = 0, behind = 0; first < added_.size(); first = behind) {
+        const auto isTwin = [&](const AddedEvent& event) {
+            return event.material == added_[first].material && twinKeyOf(event.shape) == twinKeyOf(added_[first].shape);
+        };
+        while (behind < added_.size() && isTwin(added_[behind]))
+            ++behind;
+        Material& material = materials_[added_[first].material];
+        if (material.behind == 0)
             material.first = groups_.size();
-        places_.push_back({event.shape.dstIn, event.index});
-        if (opensGroup)
-            groups_.push_back({event.shape, {&places_.back(), 1}});
-        else
-            groups_.back().places = {groups_.back().places.data(), groups_.back().places.size() + 1};
+        addGroup(first, behind);
         material.behind = groups_.size();
-        previous = &event;
     }
+    added_ = {};
+}
+
+/// Makes a group of the added events from `first` up to `behind`.
+void MaterialIndex::addGroup(std::size_t first, std::size_t behind)
+{
+    const std::span byTime = std::span(placesByTime_).subspan(first, behind - first);
+    const std::span byIndex = std::span(placesByIndex_).subspan(first, behind - first);
+    const auto hasLowerIndex = [](const TwinGroup::Place& a, const TwinGroup::Place& b) { return a.index < b.index; };
+    const bool areOrdersEqual = std::is_sorted(byIndex.begin(), byIndex.end(), hasLowerIndex);
+    if (!areOrdersEqual)
+        std::sort(byIndex.begin(), byIndex.end(), hasLowerIndex);
+    groups_.push_back({added_[first].shape, byTime, byIndex, areOrdersEqual});
 }
 
 std::int32_t MaterialIndex::makeTree(Material range)
@@ -94,6 +107,8 @@ std::vector<const TwinGroup*> MaterialIndex::groupsOverlapping(const std::string
                                                                std::int32_t srcOut) const
 {
     std::vector<const TwinGroup*> found;
+    if (srcIn >= srcOut)
+        return found;
     const auto material = materialByName_.find(name);
     if (material != materialByName_.end())
         collect(materials_[material->second], srcIn, srcOut, found);
@@ -112,7 +127,7 @@ void MaterialIndex::collect(Material range, std::int32_t srcIn, std::int32_t src
     const EventShape& shape = groups_[middle].shape;
     if (shape.srcIn >= srcOut)
         return;
-    if (std::max(shape.srcIn, srcIn) < std::min(shape.srcOut, srcOut))
+    if (shape.srcOut > srcIn)
         found.push_back(&groups_[middle]);
     collect({middle + 1, range.behind}, srcIn, srcOut, found);
 }

@@ -39,14 +39,20 @@ struct TwinGroup {
         std::size_t index; ///< of the event in the list of old events
     };
 
-    EventShape shape;              ///< of one of them
-    std::span<const Place> places; ///< ascending by `dstIn`, then by index
+    EventShape shape;                     ///< of one of them
+    std::span<const Place> placesByTime;  ///< ascending by `dstIn`, then by index
+    std::span<const Place> placesByIndex; ///< the same, ascending by index
+    bool areOrdersEqual;                  ///< as they are where the old list is in the order of time
 };
 
 /// The old events by name and source range.
 class MaterialIndex {
 public:
-    /// Adds the event at `index` of the list of old events.
+    MaterialIndex() = default;
+    MaterialIndex(const MaterialIndex&) = delete;
+    MaterialIndex& operator=(const MaterialIndex&) = delete;
+
+    /// Adds the event at `index` of the list of old events. An event without source overlaps nothing and is left out.
     void add(const std::string& name, const EventShape& shape, std::size_t index);
     /// To be called when all are added, before the first search.
     void finish();
@@ -69,6 +75,7 @@ private:
     };
 
     void makeGroups();
+    void addGroup(std::size_t first, std::size_t behind);
     std::int32_t makeTree(Material range);
     void collect(Material range, std::int32_t srcIn, std::int32_t srcOut, std::vector<const TwinGroup*>& found) const;
 
@@ -76,7 +83,8 @@ private:
     std::vector<AddedEvent> added_;
     std::vector<Material> materials_;
     std::vector<TwinGroup> groups_;
-    std::vector<TwinGroup::Place> places_;
+    std::vector<TwinGroup::Place> placesByTime_;
+    std::vector<TwinGroup::Place> placesByIndex_;
     /// Each range of groups is a binary tree with its middle as the root; this is the latest source end of the subtree
     /// under each group.
     std::vector<std::int32_t> latestEnd_;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "core/ChangeContextNotificationBase.h"
+#include "core/MatchBy.h"
 #include "core/VfxPatternEntry.h"
 #include "core/serialize/Serializable.h"
 
@@ -9,10 +10,6 @@
 #include <vector>
 
 namespace cadrel::core {
-
-struct MatchBy {
-    enum Type : std::int32_t { RollName = 0, ClipName = 1 };
-};
 
 struct HealMode {
     enum Type : std::int32_t { None = 0, Normal = 1, GapsWithoutInserts = 2, GapsWithInserts = 3 };

@@ -200,7 +200,10 @@ std::int32_t Timecode::toFrameCount(const Framerate& framerate) const
     if (!isValid(framerate))
         throw Result::OutOfRange;
     const std::int32_t minutesOfDay = hours_ * 60 + minutes_;
-    const std::int32_t written = (minutesOfDay * 60 + seconds_) * framerate.framesPerSecond + frames_;
+    const std::int64_t counted = (std::int64_t{minutesOfDay} * 60 + seconds_) * framerate.framesPerSecond + frames_;
+    if (counted > std::numeric_limits<std::int32_t>::max())
+        throw Result::OutOfRange;
+    const auto written = static_cast<std::int32_t>(counted);
     if (framerate.dropFrame == 0)
         return written;
     if (framerate.framesPerSecond != DropFrameRate)

@@ -3,7 +3,7 @@
 #include "core/CutMap.h"
 #include "core/EventBase.h"
 #include "core/EventList.h"
-#include "core/Settings.h"
+#include "core/MatchBy.h"
 #include "util/Result.h"
 
 #include <memory>
@@ -16,16 +16,6 @@ using util::Result;
 namespace {
 
 const std::string PieceNamePrefix = "TRANS_";
-
-bool isTransition(const EventBase& event)
-{
-    return event.transitionType() == TransitionType::Dissolve || event.transitionType() == TransitionType::Wipe;
-}
-
-const std::string& nameOf(const EventBase& event, std::int32_t matchBy)
-{
-    return matchBy == MatchBy::ClipName ? event.clipName() : event.rollName();
-}
 
 /// The name of a piece between two clips: the timecode stands twice in this format of name.
 std::string pieceName(const std::string& incoming, const std::string& outgoing, const std::string& timecode)
@@ -79,7 +69,7 @@ void expandTransitions(EventList& events)
     EventList pieces;
     for (std::size_t index = 0; index < events.size(); ++index) {
         EventBase& event = events.at(index);
-        if (!isTransition(event))
+        if (!event.isTransition())
             continue;
         try {
             pieces.add(cutOutTransition(event, index > 0 ? &events.at(index - 1) : nullptr));
@@ -98,12 +88,12 @@ void mergeTransitionPieces(EventList& changeEvents, std::int32_t matchBy)
     EventList absorbed;
     for (std::size_t index = 0; index < order.size(); ++index) {
         const std::shared_ptr<EventBase> piece = order[index].event.lock();
-        if (!isTransition(*piece))
+        if (!piece->isTransition())
             continue;
         if (index + 1 < order.size()) {
             const std::shared_ptr<EventBase> body = order[index + 1].event.lock();
             const bool bodyFollows = body->dstIn() == piece->dstOut() && body->srcIn() == piece->srcOut();
-            if (bodyFollows && nameOf(*piece, matchBy).starts_with(PieceNamePrefix + nameOf(*body, matchBy))) {
+            if (bodyFollows && nameBy(matchBy, *piece).starts_with(PieceNamePrefix + nameBy(matchBy, *body))) {
                 piece->setOut(body->srcOut(), body->dstOut());
                 piece->setRollName(body->rollName());
                 piece->setClipName(body->clipName());

@@ -23,6 +23,18 @@ std::wstring fileNameOf(const std::string& path)
     return StringUtil::fileNameOf(StringUtil::toWide(path));
 }
 
+/// A stored path may be no text; it has no file name then and is found by the whole path alone.
+bool hasFileName(const std::string& path, const std::wstring& fileName)
+{
+    try {
+        return fileNameOf(path) == fileName;
+    } catch (Result::Type failure) {
+        if (failure != Result::InvalidArgument)
+            throw;
+        return false;
+    }
+}
+
 } // namespace
 
 VideoList::Entry::Entry() : Serializable(PersistenceVersion) {}
@@ -39,7 +51,7 @@ std::wstring VideoList::Entry::fileName() const
 
 bool VideoList::Entry::operator==(const Entry& other) const
 {
-    return start == other.start && length == other.length && fileName() == other.fileName();
+    return start == other.start && length == other.length && (path == other.path || fileName() == other.fileName());
 }
 
 void VideoList::Entry::readCurrent(ByteArchive& archive)
@@ -82,10 +94,13 @@ bool VideoList::contains(const Entry& entry) const
 
 std::set<VideoList::Entry, std::less<>>::const_iterator VideoList::find(const std::string& path) const
 {
-    // The same path has the same file name.
+    const auto samePath =
+        std::find_if(entries_.begin(), entries_.end(), [&](const Entry& entry) { return entry.path == path; });
+    if (samePath != entries_.end())
+        return samePath;
     const std::wstring fileName = fileNameOf(path);
     return std::find_if(entries_.begin(), entries_.end(),
-                        [&](const Entry& entry) { return entry.fileName() == fileName; });
+                        [&](const Entry& entry) { return hasFileName(entry.path, fileName); });
 }
 
 Result::Type VideoList::checkAdd(const Entry& entry) const

@@ -10,7 +10,10 @@ namespace cadrel::util {
 
 namespace {
 
-constexpr std::string_view Blanks = " \n\t\r";
+bool isBlank(char character)
+{
+    return character == ' ' || character == '\n' || character == '\t' || character == '\r';
+}
 
 const StringUtil::StringConverterInterface* installedConverter = nullptr;
 
@@ -88,10 +91,11 @@ std::string StringUtil::trim(const std::string& text)
 
 std::string_view StringUtil::trimView(std::string_view text)
 {
-    const std::size_t first = text.find_first_not_of(Blanks);
-    if (first == std::string_view::npos)
-        return {};
-    return text.substr(first, text.find_last_not_of(Blanks) - first + 1);
+    while (!text.empty() && isBlank(text.front()))
+        text.remove_prefix(1);
+    while (!text.empty() && isBlank(text.back()))
+        text.remove_suffix(1);
+    return text;
 }
 
 std::vector<std::string> StringUtil::split(const std::string& text, char separator, bool dropEmpty)

@@ -36,7 +36,7 @@ public:
     /// The CRC-32 of IEEE 802.3 over all bytes; 0 when empty.
     std::uint32_t crc32() const;
 
-    std::size_t bytesLeft() const { return bytes_.size() - readPosition_; }
+    std::size_t bytesLeft() const { return readPosition_ < bytes_.size() ? bytes_.size() - readPosition_ : 0; }
     bool hasBytes(std::size_t count) const { return count <= bytesLeft(); }
     /// Throws Result::EndOfData when fewer than `count` bytes are left.
     void ensureBytes(std::size_t count) const;
