@@ -1,11 +1,10 @@
 #pragma once
 
 #include "core/ChangeCandidate.h"
-#include "core/EventList.h"
 #include "core/Framerate.h"
 #include "core/MaterialIndex.h"
 
-#include <memory>
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -23,7 +22,8 @@ class CandidateSearch {
 public:
     explicit CandidateSearch(const Framerate& framerate) : framerate_(framerate) {}
 
-    /// Adds a valid event of the old list, in the order of the list, under the name that it is compared by.
+    /// Adds a valid event of the old list, in the order of the list, under the name that it is compared by. Throws what
+    /// Timecode::toFrameCount throws for a timecode that isn't valid at the rate.
     void addOldEvent(const std::string& name, const EventBase& event);
     /// To be called when all are added, before the first search.
     void finish() { index_.finish(); }
@@ -35,10 +35,6 @@ public:
                                                      double lastDisplacement) const;
 
 private:
-    struct SharedStretch;
-    struct Survivor;
-    class NewEventSearch;
-
     Framerate framerate_;
     MaterialIndex index_;
     std::size_t oldEventCount_ = 0;

@@ -292,16 +292,20 @@ std::string Timecode::toString() const
 Timecode Timecode::operator+(const Timecode& other) const
 {
     const Framerate current = framerate();
+    const double left = toSeconds(current);
+    const double right = other.toSeconds(current);
     Timecode sum;
-    sum.setSeconds(toSeconds(current) + other.toSeconds(current), current);
+    sum.setSeconds(left + right, current);
     return sum;
 }
 
 Timecode Timecode::operator-(const Timecode& other) const
 {
     const Framerate current = framerate();
+    const double left = toSeconds(current);
+    const double right = other.toSeconds(current);
     Timecode difference;
-    difference.setSeconds(toSeconds(current) - other.toSeconds(current), current);
+    difference.setSeconds(left - right, current);
     return difference;
 }
 
