@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <sys/stat.h>
@@ -22,17 +23,23 @@ void expectStopped(const Outcome& outcome, const std::string& line)
     EXPECT_EQ(outcome.err, "cadrel: " + line + "\n");
 }
 
+using Runner = std::function<Outcome(const std::vector<std::string>&)>;
+
+Outcome runAsSelf(const std::vector<std::string>& arguments)
+{
+    return runCadrel(arguments);
+}
+
 /// A file is refused by both commands, on either side.
-void expectRefused(const std::string& file, const std::string& problem)
+void expectRefused(const std::string& file, const std::string& problem, const Runner& run = runAsSelf)
 {
     const TempFolder folder;
     const std::string good = folder.write("good.edl", oldCut());
+    giveToUnprivileged(folder.path());
 
-    expectStopped(runCadrel({"list", file}), file + ": " + problem);
-    expectStopped(runCadrel({"generate", "--old", file, "--new", good, "-o", folder / "change.edl"}),
-                  file + ": " + problem);
-    expectStopped(runCadrel({"generate", "--old", good, "--new", file, "-o", folder / "change.edl"}),
-                  file + ": " + problem);
+    expectStopped(run({"list", file}), file + ": " + problem);
+    expectStopped(run({"generate", "--old", file, "--new", good, "-o", folder / "change.edl"}), file + ": " + problem);
+    expectStopped(run({"generate", "--old", good, "--new", file, "-o", folder / "change.edl"}), file + ": " + problem);
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"good.edl"}));
 }
 
@@ -42,7 +49,7 @@ TEST(BadInput, NoSuchFile)
 
     expectRefused(folder / "none.edl", "no such file; check the name and the folder");
     expectRefused(folder / "none/none.edl", "no such file; check the name and the folder");
-    expectRefused(folder.write("file", "x") + "/none.edl", "no such file; check the name and the folder");
+    expectRefused(folder.write("file", "x") / "none.edl", "no such file; check the name and the folder");
     expectRefused("", "no such file; check the name and the folder");
 }
 
@@ -66,13 +73,12 @@ TEST(BadInput, AFileWhoseReadingBreaksOff)
 
 TEST(BadInput, AFileWithoutTheRightToRead)
 {
-    if (geteuid() == 0)
-        GTEST_SKIP() << "root may read everything";
     const TempFolder folder;
     const std::string file = folder.write("secret.edl", oldCut());
     std::filesystem::permissions(file, std::filesystem::perms::none);
+    giveToUnprivileged(folder.path());
 
-    expectRefused(file, "you may not read it; ask its owner for the right to read");
+    expectRefused(file, "you may not read it; ask its owner for the right to read", runCadrelUnprivileged);
 }
 
 TEST(BadInput, AFileWithoutEvents)
@@ -162,9 +168,9 @@ TEST(BadInput, AFileNameThatIsNoUtf8)
     const std::string good = folder.write("good.edl", oldCut());
 
     expectStopped(runCadrel({"list", file}),
-                  folder / "caf?.edl" + ": the name is no UTF-8 text; rename the file or its folder");
+                  (folder / "caf?.edl").string() + ": the name is no UTF-8 text; rename the file or its folder");
     expectStopped(runCadrel({"generate", "--old", good, "--new", good, "-o", folder / "caf\xe9"}),
-                  folder / "caf?" + ": the name is no UTF-8 text; rename the file or its folder");
+                  (folder / "caf?").string() + ": the name is no UTF-8 text; rename the file or its folder");
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"caf\xe9.edl", "good.edl"}));
 }
 
@@ -176,22 +182,23 @@ TEST(BadInput, ANameCantForgeASecondLine)
 }
 
 /// An output that can't be written, in the place of the change EDL and in that of the JSON.
-void expectUnwritable(const std::string& path, const std::string& problem)
+void expectUnwritable(const std::string& path, const std::string& problem, const Runner& run = runAsSelf)
 {
     const TempFolder folder;
     const std::string oldFile = folder.write("old.edl", oldCut());
     const std::string newFile = folder.write("new.edl", newCut());
+    giveToUnprivileged(folder.path());
     const std::vector<std::string> command{"generate", "--old", oldFile, "--new", newFile};
-    const auto with = [&command](const std::vector<std::string>& more) {
+    const auto with = [&](const std::vector<std::string>& more) {
         std::vector<std::string> arguments = command;
         arguments.insert(arguments.end(), more.begin(), more.end());
-        return runCadrel(arguments);
+        return run(arguments);
     };
 
     expectStopped(with({"-o", path}), path + ": " + problem);
     expectStopped(with({"-o", path, "--json", folder / "change.json"}), path + ": " + problem);
     expectStopped(with({"-o", folder / "change.edl", "--json", path}), path + ": " + problem);
-    expectStopped(runCadrel({"list", oldFile, "--json", path}), path + ": " + problem);
+    expectStopped(run({"list", oldFile, "--json", path}), path + ": " + problem);
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
 }
 
@@ -205,7 +212,7 @@ TEST(BadOutput, AFolderThatDoesNotExist)
     const TempFolder folder;
 
     expectUnwritable(folder / "none/change.edl", "the folder does not exist; make it or give another");
-    expectUnwritable(folder.write("file", "x") + "/change.edl",
+    expectUnwritable(folder.write("file", "x") / "change.edl",
                      "what should be the folder is a file; give another name");
 }
 
@@ -221,22 +228,25 @@ TEST(BadOutput, AFolderInThePlaceOfTheFile)
 
 TEST(BadOutput, AFolderThatTakesNoFiles)
 {
-    const std::string path = "/proc/change.edl";
-    const bool mayWrite = access("/proc", W_OK) == 0; // root is not held back by rights, but the system is
+    const std::string problem = "you may not write into the folder; give another folder";
+    const TempFolder folder;
+    std::filesystem::permissions(folder.path(),
+                                 std::filesystem::perms::owner_read | std::filesystem::perms::owner_exec);
+    giveToUnprivileged(folder.path());
 
-    expectUnwritable(path, mayWrite ? "can't be written; see whether the disk is full"
-                                    : "you may not write into the folder; give another folder");
+    expectUnwritable("/proc/change.edl", problem, runCadrelUnprivileged);
+    expectUnwritable(folder / "change.edl", problem, runCadrelUnprivileged);
 }
 
 TEST(BadOutput, AFileProtectedAgainstWriting)
 {
-    if (geteuid() == 0)
-        GTEST_SKIP() << "root may write everything";
     const TempFolder folder;
     const std::string file = folder.write("change.edl", "former list");
     std::filesystem::permissions(file, std::filesystem::perms::owner_read);
+    giveToUnprivileged(folder.path());
+    giveToUnprivileged(file);
 
-    expectUnwritable(file, "is protected against writing; give another name");
+    expectUnwritable(file, "is protected against writing; give another name", runCadrelUnprivileged);
     EXPECT_EQ(contentOf(file), "former list");
 }
 

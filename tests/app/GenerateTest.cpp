@@ -102,7 +102,7 @@ TEST(Generate, PrintsASummary)
                            "            01:00:18:00  01:00:22:00  00:00:04:00  NEW\n"
                            "\n"
                            "Written     " +
-                               film.folder / "change.edl" + "\n");
+                               (film.folder / "change.edl").string() + "\n");
 }
 
 TEST(Generate, WithoutAFileThereIsOnlyTheSummary)
@@ -242,8 +242,8 @@ TEST(Generate, MoreThan999EventsGoIntoSeveralFiles)
     EXPECT_EQ(contentOf(film.folder / "change_2.edl"),
               "TITLE:   change_2.edl\n"
               "001  R999     V     C        01:16:39:00 01:16:40:00 01:16:39:00 01:16:40:00\n");
-    EXPECT_TRUE(outcome.out.ends_with("Written     " + film.folder / "change_1.edl" + ", " +
-                                      film.folder / "change_2.edl" + "\n"))
+    EXPECT_TRUE(outcome.out.ends_with("Written     " + (film.folder / "change_1.edl").string() + ", " +
+                                      (film.folder / "change_2.edl").string() + "\n"))
         << outcome.out;
 }
 

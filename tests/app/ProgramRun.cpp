@@ -1,6 +1,5 @@
 #include "tests/app/ProgramRun.h"
 
-#include <algorithm>
 #include <array>
 #include <cstdlib>
 #include <fcntl.h>
@@ -14,46 +13,6 @@
 extern char** environ; // NOLINT(readability-redundant-declaration): POSIX leaves it to the program
 
 namespace cadrel::tests {
-
-namespace fs = std::filesystem;
-
-TempFolder::TempFolder()
-{
-    std::string pattern = (fs::temp_directory_path() / "cadrel-test-XXXXXX").string();
-    if (mkdtemp(pattern.data()) == nullptr)
-        throw std::runtime_error("no temporary folder");
-    path_ = pattern;
-}
-
-TempFolder::~TempFolder()
-{
-    std::error_code error;
-    fs::remove_all(path_, error);
-}
-
-std::string TempFolder::write(const std::string& name, std::string_view content) const
-{
-    std::ofstream file(path_ / name, std::ios::binary);
-    file << content;
-    if (!file.flush())
-        throw std::runtime_error("can't write " + name);
-    return *this / name;
-}
-
-std::vector<std::string> TempFolder::names() const
-{
-    std::vector<std::string> names;
-    for (const auto& entry : fs::directory_iterator(path_))
-        names.push_back(entry.path().filename().string());
-    std::sort(names.begin(), names.end());
-    return names;
-}
-
-std::string contentOf(const std::string& path)
-{
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
-}
 
 namespace {
 
@@ -89,13 +48,18 @@ std::vector<char*> pointersTo(std::vector<std::string>& words)
     return pointers;
 }
 
-pid_t start(const std::vector<std::string>& arguments, const Outputs& outputs, char** environment)
+std::vector<std::string> commandLine(const std::string& program, const std::vector<std::string>& arguments)
 {
-    std::vector<std::string> words{CADREL_PROGRAM};
+    std::vector<std::string> words{program};
     words.insert(words.end(), arguments.begin(), arguments.end());
+    return words;
+}
+
+pid_t start(std::vector<std::string> words, const Outputs& outputs, char** environment)
+{
     pid_t child = 0;
-    if (posix_spawn(&child, CADREL_PROGRAM, outputs.actions(), nullptr, pointersTo(words).data(), environment) != 0)
-        throw std::runtime_error("can't run " CADREL_PROGRAM);
+    if (posix_spawnp(&child, words[0].c_str(), outputs.actions(), nullptr, pointersTo(words).data(), environment) != 0)
+        throw std::runtime_error("can't run " + words[0]);
     return child;
 }
 
@@ -103,24 +67,57 @@ int exitStatusOf(pid_t child)
 {
     int state = 0;
     if (waitpid(child, &state, 0) != child)
-        throw std::runtime_error("lost " CADREL_PROGRAM);
+        throw std::runtime_error("lost the program");
     return WIFEXITED(state) ? WEXITSTATUS(state) : -1;
+}
+
+Outcome run(const std::vector<std::string>& words, const std::string& outPath)
+{
+    const TempFolder folder;
+    const std::string out = outPath.empty() ? (folder / "out").string() : outPath;
+    const std::string err = folder / "err";
+    Outputs outputs;
+    outputs.open(STDOUT_FILENO, out);
+    outputs.open(STDERR_FILENO, err);
+
+    const int status = exitStatusOf(start(words, outputs, environ));
+
+    return {status, outPath.empty() ? contentOf(out) : std::string(), contentOf(err)};
+}
+
+constexpr uid_t Nobody = 65534;
+
+bool isRoot()
+{
+    return geteuid() == 0;
 }
 
 } // namespace
 
 Outcome runCadrel(const std::vector<std::string>& arguments, const std::string& outPath)
 {
+    return run(commandLine(CADREL_PROGRAM, arguments), outPath);
+}
+
+Outcome runCadrelUnprivileged(const std::vector<std::string>& arguments)
+{
+    if (!isRoot())
+        return runCadrel(arguments);
+    // The build may stand in a folder that only root may enter.
     const TempFolder folder;
-    const std::string out = outPath.empty() ? folder / "out" : outPath;
-    const std::string err = folder / "err";
-    Outputs outputs;
-    outputs.open(STDOUT_FILENO, out);
-    outputs.open(STDERR_FILENO, err);
+    const std::string program = folder / "cadrel";
+    std::filesystem::copy_file(CADREL_PROGRAM, program);
+    giveToUnprivileged(folder.path());
+    const std::string id = std::to_string(Nobody);
+    std::vector<std::string> words{"setpriv", "--reuid=" + id, "--regid=" + id, "--clear-groups", program};
+    words.insert(words.end(), arguments.begin(), arguments.end());
+    return run(words, {});
+}
 
-    const int status = exitStatusOf(start(arguments, outputs, environ));
-
-    return {status, outPath.empty() ? contentOf(out) : std::string(), contentOf(err)};
+void giveToUnprivileged(const std::filesystem::path& path)
+{
+    if (isRoot() && chown(path.c_str(), Nobody, Nobody) != 0)
+        throw std::runtime_error("can't give " + path.string() + " away");
 }
 
 Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std::string& environment)
@@ -133,7 +130,7 @@ Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std
     outputs.open(STDERR_FILENO, ptsname(terminal));
     std::vector<std::string> variables{"TERM=xterm", environment};
 
-    const pid_t child = start(arguments, outputs, pointersTo(variables).data());
+    const pid_t child = start(commandLine(CADREL_PROGRAM, arguments), outputs, pointersTo(variables).data());
     std::string shown;
     std::array<char, 4096> part{};
     // The reading fails once the program has closed its side.

@@ -1,8 +1,8 @@
 #pragma once
 
-#include <filesystem>
+#include "tests/util/TempFolder.h"
+
 #include <string>
-#include <string_view>
 #include <vector>
 
 namespace cadrel::tests {
@@ -14,30 +14,14 @@ struct Outcome {
     std::string err;
 };
 
-/// A folder of one test, gone with it.
-class TempFolder {
-public:
-    TempFolder();
-    TempFolder(const TempFolder&) = delete;
-    TempFolder& operator=(const TempFolder&) = delete;
-    ~TempFolder();
-
-    /// The path of a file in it.
-    std::string operator/(const std::string& name) const { return (path_ / name).string(); }
-    /// Writes a file into it and returns its path.
-    std::string write(const std::string& name, std::string_view content) const;
-    /// The names of everything in it, sorted.
-    std::vector<std::string> names() const;
-
-private:
-    std::filesystem::path path_;
-};
-
-std::string contentOf(const std::string& path);
-
 /// Runs `cadrel` with the arguments and standard output caught, or going to `outPath` if given. Standard input is
 /// empty, and neither output is a terminal.
 Outcome runCadrel(const std::vector<std::string>& arguments, const std::string& outPath = {});
+
+/// Runs `cadrel` as a user without root's rights: as "nobody" where the tests themselves run as root.
+Outcome runCadrelUnprivileged(const std::vector<std::string>& arguments);
+/// Makes that user the owner of a file or folder.
+void giveToUnprivileged(const std::filesystem::path& path);
 
 /// Runs `cadrel` with both outputs on a terminal; what it showed stands in `out`. `environment` is added to what is
 /// set for the run, such as "NO_COLOR=1".
