@@ -24,7 +24,7 @@ run:
 test:
 	@cmake/build.sh $(PRESET)
 	ctest --test-dir build/$(PRESET) --parallel $$(nproc) --output-on-failure --no-tests=error \
-	    --output-junit $(CURDIR)/build/$(PRESET)/tests.xml
+	    --output-junit "$(CURDIR)/build/$(PRESET)/tests.xml"
 
 build:
 	@cmake/build.sh $(PRESET)

@@ -150,6 +150,8 @@ private:
     {
         if (stretch.group().areOrdersEqual)
             return {&stretch, nearestPlace(stretch, run)};
+        if (run.size() == stretch.group().placesByTime.size())
+            return {&stretch, nearestPlace(stretch, stretch.group().placesByTime)};
         Placement best{&stretch, run.front()};
         for (const TwinGroup::Place& place : run.subspan(1)) {
             if (isNearer({&stretch, place}, best))

@@ -24,10 +24,10 @@ std::wstring fileNameOf(const std::string& path)
 }
 
 /// A stored path may be no text; it has no file name then and is found by the whole path alone.
-bool hasFileName(const std::string& path, const std::wstring& fileName)
+bool isSameFile(const std::string& stored, const std::string& path)
 {
     try {
-        return fileNameOf(path) == fileName;
+        return stored == path || fileNameOf(stored) == fileNameOf(path);
     } catch (Result::Type failure) {
         if (failure != Result::InvalidArgument)
             throw;
@@ -51,7 +51,7 @@ std::wstring VideoList::Entry::fileName() const
 
 bool VideoList::Entry::operator==(const Entry& other) const
 {
-    return start == other.start && length == other.length && (path == other.path || fileName() == other.fileName());
+    return start == other.start && length == other.length && isSameFile(path, other.path);
 }
 
 void VideoList::Entry::readCurrent(ByteArchive& archive)
@@ -98,9 +98,9 @@ std::set<VideoList::Entry, std::less<>>::const_iterator VideoList::find(const st
         std::find_if(entries_.begin(), entries_.end(), [&](const Entry& entry) { return entry.path == path; });
     if (samePath != entries_.end())
         return samePath;
-    const std::wstring fileName = fileNameOf(path);
+    fileNameOf(path); // throws for a path that can't be looked for
     return std::find_if(entries_.begin(), entries_.end(),
-                        [&](const Entry& entry) { return hasFileName(entry.path, fileName); });
+                        [&](const Entry& entry) { return isSameFile(entry.path, path); });
 }
 
 Result::Type VideoList::checkAdd(const Entry& entry) const

@@ -114,8 +114,11 @@ void FileReplacement::putInPlace()
         return;
     std::error_code error;
     if (fs::is_regular_file(target_, error)) {
+        // By a second name the former file stays in its place until the new one takes it. Some disks know no such names.
         const fs::path aside = unusedNameBeside(target_);
-        fs::rename(target_, aside, error);
+        fs::create_hard_link(target_, aside, error);
+        if (error)
+            fs::rename(target_, aside, error);
         if (error)
             throw Result::FileAccessFailed;
         former_ = aside;

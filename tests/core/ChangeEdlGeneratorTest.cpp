@@ -11,6 +11,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <memory>
 #include <string>
 #include <vector>
@@ -150,6 +151,16 @@ TEST(ChangeEdlGenerator, RangesThatOnlyTouchDoNotMatch)
     EXPECT_TRUE(changes.isEmpty());
 }
 
+TEST(ChangeEdlGenerator, AnEmptyRangeMatchesNothingThatLiesAroundIt)
+{
+    const TestProject project;
+    const Event empty = makeEvent("A", "00:01:05:00", "00:01:05:00", "01:00:05:00", "01:00:05:00");
+    const Event around = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
+
+    EXPECT_TRUE(generated({around}, {empty}).isEmpty());
+    EXPECT_TRUE(generated({empty}, {around}).isEmpty());
+}
+
 TEST(ChangeEdlGenerator, TheSameMaterialUnderAnotherNameDoesNotMatch)
 {
     const TestProject project;
@@ -202,6 +213,22 @@ TEST(ChangeEdlGenerator, AtAnExactTieTheLaterOldEventWins)
               (Lines{"1 A 01:00:40:00 01:00:50:00 01:00:20:00 01:00:30:00"}));
     EXPECT_EQ(linesOf(generated({behind, before}, {placed})),
               (Lines{"1 A 01:00:00:00 01:00:10:00 01:00:20:00 01:00:30:00"}));
+}
+
+TEST(ChangeEdlGenerator, OfAnOldEventThatIsListedTwiceTheLaterOneStands)
+{
+    const TestProject project;
+    const auto listed = [] { return makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"); };
+    const Event between = makeEvent("A", "00:01:10:00", "00:01:20:00", "01:30:00:00", "01:30:10:00");
+    const Event placedBefore = makeEvent("A", "00:01:00:00", "00:01:20:00", "00:10:00:00", "00:10:20:00");
+    const Event placedBehind = makeEvent("A", "00:01:00:00", "00:01:20:00", "02:00:00:00", "02:00:20:00");
+
+    EXPECT_EQ(linesOf(generated({listed(), between, listed()}, {placedBefore})),
+              (Lines{"1 A 01:30:00:00 01:30:10:00 00:10:10:00 00:10:20:00",
+                     "2 A 01:00:00:00 01:00:10:00 00:10:00:00 00:10:10:00"}));
+    EXPECT_EQ(linesOf(generated({listed(), between, listed()}, {placedBehind})),
+              (Lines{"1 A 01:30:00:00 01:30:10:00 02:00:10:00 02:00:20:00",
+                     "2 A 01:00:00:00 01:00:10:00 02:00:00:00 02:00:10:00"}));
 }
 
 //  source of the new event   |----------------|
@@ -622,6 +649,35 @@ TEST(ChangeEdlGenerator, AStretchThatLeavesTheDayFails)
     EXPECT_EQ(thrownBy([&] { ChangeEdlGenerator().generate(oldEvents, newEvents, changes); }), Result::OutOfRange);
 }
 
+// Which of two old places wins is decided among stretches that both exist.
+TEST(ChangeEdlGenerator, AStretchThatLeavesTheDayFailsAlsoWhereAnotherOneWouldWin)
+{
+    const TestProject project;
+    const EventList twins = listOf({makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00"),
+                                    makeEvent("A", "00:01:00:00", "00:01:08:01", "23:59:51:24", "23:59:59:24")});
+    const EventList placed = listOf({makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00")});
+    EventList changes;
+
+    EXPECT_EQ(thrownBy([&] { ChangeEdlGenerator().generate(twins, placed, changes); }), Result::OutOfRange);
+}
+
+// At half speed the second candidate reaches from 23:59:57 for four seconds; the first, of six seconds, overlaps it.
+TEST(ChangeEdlGenerator, AStretchWhoseSourceLeavesTheDayFailsAlsoWhereAnotherOneWouldWin)
+{
+    const TestProject project;
+    const Event winner = makeEvent("A", "23:59:53:00", "23:59:56:00", "01:00:00:00", "01:00:06:00");
+    const Event leaver = makeEvent("A", "23:59:55:00", "23:59:57:00", "01:01:00:00", "01:01:04:00");
+    const EventList placed = listOf({makeEvent("A", "23:59:53:00", "23:59:57:00", "01:00:00:00", "01:00:08:00")});
+    EventList changes;
+
+    EXPECT_EQ(ChangeEdlGenerator().generate(listOf({winner}), placed, changes), Result::Ok);
+    EXPECT_EQ(changes.size(), 1u);
+    EXPECT_EQ(thrownBy([&] {
+                  ChangeEdlGenerator().generate(listOf({winner, leaver}), placed, changes);
+              }),
+              Result::OutOfRange);
+}
+
 TEST(ChangeEdlGenerator, ATransitionThatLeavesTheDayFailsForAValidEvent)
 {
     const TestProject project;
@@ -648,6 +704,76 @@ TEST(ChangeEdlGenerator, AnInvalidEventWhoseTransitionCannotBeCutOutTakesNoPart)
     const std::vector<Event> programme = {atTheEnd, reversed, outOfRate, plain};
 
     EXPECT_EQ(linesOf(generated(programme, programme)), (Lines{"1 B 01:00:10:00 01:00:20:00 01:00:10:00 01:00:20:00"}));
+}
+
+// The piece ends within its event, so that nothing of it is out of the rate; the body keeps its SRC OUT.
+TEST(ChangeEdlGenerator, ThePieceOfADissolveWhoseSourceEndIsOutOfTheRateTakesPartAndItsBodyDoesNot)
+{
+    const TestProject project;
+    const Event outOfRate = makeTransition(TransitionType::Dissolve, 25,
+                                           makeEvent("A", "00:01:00:00", "00:01:10:29", "01:00:00:00", "01:00:10:00"));
+    const Event intact = makeTransition(TransitionType::Dissolve, 25,
+                                        makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:30:00", "01:00:40:00"));
+    ASSERT_TRUE(outOfRate->hasFlaw(core::EventFlaw::TimecodeInvalid));
+
+    EXPECT_EQ(linesOf(generated({outOfRate}, {outOfRate})),
+              (Lines{"1 A 01:00:00:00 01:00:01:00 01:00:00:00 01:00:01:00"}));
+    EXPECT_EQ(linesOf(generated({outOfRate}, {intact})),
+              (Lines{"1 A 01:00:00:00 01:00:01:00 01:00:30:00 01:00:31:00"}));
+    EXPECT_EQ(linesOf(generated({intact}, {outOfRate})),
+              (Lines{"1 A 01:00:30:00 01:00:31:00 01:00:00:00 01:00:01:00"}));
+    EXPECT_TRUE(outOfRate->hasFlaw(core::EventFlaw::TimecodeInvalid));
+}
+
+// The timecodes of a copy count as set, which shows as soon as the transition is cut out of it.
+TEST(ChangeEdlGenerator, ADissolveWithAnUnsetTimecodeTakesPartAndACutWithOneDoesNot)
+{
+    const TestProject project;
+    const auto withoutDstIn = [] {
+        const auto event = std::make_shared<EventBase>();
+        event->setRollName("A");
+        event->setSrc(Timecode("00:01:00:00"), Timecode("00:01:10:00"));
+        event->setDstOut(Timecode("00:00:10:00"));
+        return event;
+    };
+    const auto dissolve = [&] { return makeTransition(TransitionType::Dissolve, 25, withoutDstIn()); };
+    ASSERT_EQ(dissolve()->flaws(), std::vector<std::int32_t>{core::EventFlaw::TimecodeUninitialized});
+
+    EXPECT_EQ(linesOf(generated({dissolve()}, {dissolve()})),
+              (Lines{"1 A 00:00:00:00 00:00:01:00 00:00:00:00 00:00:01:00",
+                     "2 A 00:00:01:00 00:00:10:00 00:00:01:00 00:00:10:00"}));
+    EXPECT_TRUE(generated({withoutDstIn()}, {withoutDstIn()}).isEmpty());
+}
+
+TEST(ChangeEdlGenerator, AnInvalidFirstLineOfADissolveStillGivesItsNameToThePiece)
+{
+    const TestProject project;
+    std::vector<Event> dissolve = makeDissolve("A", "01:00:05:00", "01:00:15:00");
+    dissolve.front()->setSrcOut(Timecode("00:00:05:29"));
+    ASSERT_FALSE(dissolve.front()->isValid());
+    // The transition takes all of its event, and no body is left whose name the piece would take.
+    dissolve.back()->setTransitionDuration(250);
+
+    const EventList changes = generated(dissolve, dissolve);
+
+    EXPECT_EQ(linesOf(changes), (Lines{"1 TRANS_B--A_00:00:05:29_00:00:05:29 01:00:05:00 01:00:15:00 "
+                                       "01:00:05:00 01:00:15:00"}));
+    ASSERT_EQ(changes.size(), 1u);
+    EXPECT_EQ(changes.at(0).clipName(), "TRANS_clip B--clip A_00:00:05:29_00:00:05:29");
+}
+
+TEST(ChangeEdlGenerator, ADissolveFromAnInvalidFirstLineIsMergedWithItsBody)
+{
+    const TestProject project;
+    const auto fromUnreadable = [](const char* dstIn, const char* dstOut) {
+        std::vector<Event> dissolve = makeDissolve("A", dstIn, dstOut);
+        dissolve.front()->addFlaw(core::EventFlaw::NotVideoEvent);
+        return dissolve;
+    };
+
+    EXPECT_EQ(
+        linesOf(generated(fromUnreadable("01:00:05:00", "01:00:15:00"), fromUnreadable("01:00:25:00", "01:00:35:00"))),
+        (Lines{"1 B 01:00:05:00 01:00:15:00 01:00:25:00 01:00:35:00"}));
 }
 
 TEST(ChangeEdlGenerator, NothingInCommonGivesAnEmptyListInPlaceOfTheFormer)

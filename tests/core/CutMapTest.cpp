@@ -10,6 +10,7 @@
 #include <rapidcheck/gtest.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <limits>
 #include <memory>
 #include <string>
@@ -396,6 +397,17 @@ TEST(CutMapUncoveredRanges, AnEventInTheMiddleLeavesAPieceOnEachSide)
     EXPECT_EQ(map.uncoveredDestinationRanges({0.0, 30.0}), (Ranges{{0.0, 10.0}, {20.0, 30.0}}));
 }
 
+TEST(CutMapUncoveredRanges, AnEventOfNoLengthCoversNothingAndSplitsNothing)
+{
+    const TestProject project;
+    const Event empty = inProgramme(10, 10);
+    const EventList list = listOf({empty});
+    const CutMap map(list, project.framerate);
+
+    EXPECT_EQ(locked(map.eventsInDestinationRange(0.0, 30.0)), (Events{empty}));
+    EXPECT_EQ(map.uncoveredDestinationRanges({0.0, 30.0}), (Ranges{{0.0, 30.0}}));
+}
+
 TEST(CutMapUncoveredRanges, AnEventAcrossAnEdgeOfTheRangeLeavesTheRest)
 {
     const TestProject project;
@@ -515,6 +527,11 @@ RC_GTEST_PROP(CutMapUncoveredRanges, WhatIsLeftOfASpanIsWhatNoEventCovers, ())
         });
         RC_ASSERT(pieces == (liesWithin(middle, covered) ? 0 : 1));
     }
+    for (const SecondsRange& range : left)
+        RC_ASSERT(range.start < range.end);
+    // What parts two neighbours is an event with a length.
+    for (std::size_t i = 1; i < left.size(); ++i)
+        RC_ASSERT(left[i - 1].end < left[i].start);
 }
 
 RC_GTEST_PROP(CutMap, TheOrderIsThatOfAStableSort, ())

@@ -1,7 +1,6 @@
 #include "core/DataModel.h"
 
 #include "core/DataModelCommandCreator.h"
-#include "core/HealedEvent.h"
 #include "core/serialize/ByteArchive.h"
 #include "tests/core/EventMaking.h"
 #include "tests/core/HexBytes.h"
@@ -32,7 +31,6 @@ using core::DataModel;
 using core::EventBase;
 using core::EventList;
 using core::Framerate;
-using core::HealedEvent;
 using core::PropertyKey;
 using core::Timecode;
 using core::Variant;
@@ -101,7 +99,20 @@ protected:
     DataModel model;
 };
 
-// ----------------------------------------------------------------------------------------------------- notification
+/// Breaks into a change of a list, once, with an exception that is none of the system's own.
+class Saboteur : public core::ChangeContextListenerInterface {
+public:
+    void onChange(const ChangeContext&) override
+    {
+        if (!done_) {
+            done_ = true;
+            throw std::runtime_error("out of order");
+        }
+    }
+
+private:
+    bool done_ = false;
+};
 
 TEST_F(Model, HoldsAnOldANewAndAChangeList)
 {
@@ -178,8 +189,6 @@ TEST_F(Model, StopsAndStartsListeningToAllMembersInSilence)
     EXPECT_EQ(heard().types, Types{ChangeContext::VideoListChanged});
 }
 
-// ------------------------------------------------------------------------------------------------------- properties
-
 TEST_F(Model, AnAbsentPropertyIsAResultAndNoException)
 {
     Variant value(std::int32_t{7});
@@ -238,8 +247,6 @@ TEST_F(Model, TellsTheStateOfThePreview)
 
     EXPECT_EQ(heard().types, Types{ChangeContext::PreviewStateChanged});
 }
-
-// ------------------------------------------------------------------------------------------------------- generation
 
 TEST_F(Model, GeneratingFromAnEmptyOldListGivesAnEmptyChangeListAndOneChangeOfKindTwo)
 {
@@ -306,6 +313,25 @@ TEST_F(Model, GeneratingHealsByTheHealSetting)
     EXPECT_EQ(model.changeEdl().at(0).rollName(), "Healed Event 001");
 }
 
+TEST_F(Model, GeneratingFindsInsertsInTheNewList)
+{
+    for (EventList* list : {&model.oldEdl(), &model.newEdl()}) {
+        list->add(makeEvent("A", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00"));
+        list->add(makeEvent("B", "00:20:00:00", "00:20:08:00", "01:00:12:00", "01:00:20:00"));
+    }
+    const auto insert = makeEvent("C", "00:30:00:00", "00:30:01:00", "01:00:10:12", "01:00:11:12");
+    model.settings().setHealMode(core::HealMode::GapsWithoutInserts);
+
+    model.oldEdl().add(insert);
+    EXPECT_EQ(model.generateChangeEdl(), Result::Ok);
+    EXPECT_EQ(model.changeEdl().size(), 1U);
+
+    model.oldEdl().erase(2, 1);
+    model.newEdl().add(insert);
+    EXPECT_EQ(model.generateChangeEdl(), Result::Ok);
+    EXPECT_EQ(model.changeEdl().size(), 2U);
+}
+
 TEST_F(Model, GeneratingComparesWithTheVfxRowsInUse)
 {
     model.oldEdl().add(makeEvent("VFX_1", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00"));
@@ -364,7 +390,25 @@ TEST_F(Model, AFailureOfTheHealingEmptiesTheChangeListAndIsTheResult)
     EXPECT_TRUE(isListening());
 }
 
-// -------------------------------------------------------------------------------------------------------------- VFX
+TEST_F(Model, AnyOtherExceptionLeavesTheGenerationAndTheModelDeaf)
+{
+    fill();
+    Saboteur saboteur;
+    model.changeEdl().addListener(&saboteur);
+
+    EXPECT_THROW(model.generateChangeEdl(), std::runtime_error);
+
+    EXPECT_TRUE(heard().types.empty());
+    model.oldEdl().clear();
+    model.newEdl().clear();
+    model.settings().setMatchBy(1);
+    model.videoList().clear();
+    EXPECT_TRUE(heard().types.empty());
+
+    model.startListening();
+    EXPECT_TRUE(isListening());
+    model.changeEdl().removeListener(&saboteur);
+}
 
 TEST_F(Model, MarksTheVfxShotsOfTheOldAndTheNewListAlone)
 {
@@ -418,8 +462,6 @@ TEST_F(Model, MarkingWithARowThatDoesNotCompileTouchesNoEvent)
     EXPECT_FALSE(event->vfx());
     EXPECT_TRUE(heard().types.empty());
 }
-
-// --------------------------------------------------------------------------------------------- events behind a change
 
 //  old programme   |--- a ---|--- b ---|--- c ---|
 //                  10        20        30        40 s
@@ -557,8 +599,6 @@ TEST_F(BehindAChange, AskingIsNoChange)
     EXPECT_EQ(heard().listKinds, Types{0});
 }
 
-// ------------------------------------------------------------------------------------------- revalidation and reset
-
 TEST_F(Model, RevalidatingLooksAtAllListsAndSendsOneContextOfTheModel)
 {
     const auto late = [] { return makeEvent("A", "00:00:00:24", "00:00:01:00", "00:00:00:24", "00:00:01:00"); };
@@ -576,6 +616,20 @@ TEST_F(Model, RevalidatingLooksAtAllListsAndSendsOneContextOfTheModel)
     EXPECT_EQ(heard().types, Types{ChangeContext::DataModelChanged});
     EXPECT_EQ(heard().dataModels, std::vector<DataModel*>{&model});
     EXPECT_TRUE(isListening());
+}
+
+TEST_F(Model, RevalidatingWithoutAFrameRateFailsAndTheModelListensOn)
+{
+    fill();
+    Timecode::setFramerateProvider(nullptr);
+
+    EXPECT_EQ(thrownBy([&] { model.revalidateEvents(); }), Result::NotAvailable);
+
+    EXPECT_TRUE(heard().types.empty());
+    EXPECT_TRUE(isListening());
+    forget();
+    model.newEdl().at(0).setRollName("heard");
+    EXPECT_EQ(heard().listKinds, Types{1});
 }
 
 TEST_F(Model, ResettingGivesAFreshModelThatKeepsThePatternRows)
@@ -604,8 +658,6 @@ TEST_F(Model, ResettingAListeningModelIsHeard)
     model.reset();
     EXPECT_TRUE(heard().types.empty());
 }
-
-// ---------------------------------------------------------------------------------------------------------- reading
 
 TEST_F(Model, ReadingSendsOneContextOfTheModelAndListensToWhatItRead)
 {
@@ -658,11 +710,17 @@ TEST_F(Model, AFailedReadingOfAnOlderStreamIsAnUnknownVersionWhateverItsCause)
 
 TEST_F(Model, AnOlderVersionThatNeverWasIsUnknownAndNothingIsRead)
 {
+    fill();
     ByteArchive archive = archiveOf("00 00 00 00  00 00 00 00");
 
     EXPECT_EQ(thrownBy([&] { model.readOlder(archive, 2); }), Result::UnknownVersion);
 
     EXPECT_EQ(archive.bytesLeft(), 8U);
+    expectEmptyBesideSettings();
+    expectDefaultOptions();
+    EXPECT_EQ(heard().types, Types{ChangeContext::DataModelChanged});
+    EXPECT_EQ(heard().dataModels, std::vector<DataModel*>{&model});
+    EXPECT_TRUE(isListening());
 }
 
 TEST_F(Model, ANewerStreamIsRefusedAndLeavesTheModelAsItIs)
@@ -675,21 +733,6 @@ TEST_F(Model, ANewerStreamIsRefusedAndLeavesTheModelAsItIs)
     EXPECT_EQ(model.oldEdl().size(), 1U);
     EXPECT_TRUE(heard().types.empty());
 }
-
-/// Breaks into the reading of a list, once, with an exception that is none of the system's own.
-class Saboteur : public core::ChangeContextListenerInterface {
-public:
-    void onChange(const ChangeContext&) override
-    {
-        if (!done_) {
-            done_ = true;
-            throw std::runtime_error("out of order");
-        }
-    }
-
-private:
-    bool done_ = false;
-};
 
 TEST_F(Model, AnyOtherExceptionDuringTheReadingMeansNotAvailable)
 {
@@ -717,8 +760,6 @@ TEST_F(Model, AnyOtherExceptionDuringTheReadingMeansNotAvailable)
     model.newEdl().removeListener(&first);
     model.newEdl().removeListener(&second);
 }
-
-// ---------------------------------------------------------------------------------------------------------- restore
 
 TEST_F(Model, RestoringBringsAllBackButTheSettings)
 {
@@ -763,6 +804,22 @@ TEST_F(Model, AFailedRestoringKeepsTheSettingsSendsOneContextAndThrowsOn)
     EXPECT_TRUE(isListening());
 }
 
+TEST_F(Model, AFailedRestoringOfAnOlderSnapshotKeepsTheSettingsAndSendsOneContext)
+{
+    fill();
+    // The old list is empty, and the new one breaks off behind its count.
+    ByteArchive snapshot = archiveOf("00 00 00 00  00 00 00 00 00 00 00 00  00 00 00 00 01 00 00 00");
+
+    EXPECT_EQ(thrownBy([&] { model.restore(snapshot); }), Result::UnknownVersion);
+
+    expectEmptyBesideSettings();
+    EXPECT_EQ(model.settings().healMode(), core::HealMode::GapsWithInserts);
+    EXPECT_EQ(model.settings().vfxPattern(0), VfxPatternEntry("VFX_", "", true));
+    EXPECT_EQ(heard().types, Types{ChangeContext::DataModelChanged});
+    EXPECT_EQ(heard().dataModels, std::vector<DataModel*>{&model});
+    EXPECT_TRUE(isListening());
+}
+
 TEST_F(Model, RestoringFromANewerOrAnEmptyStreamSendsOneContextToo)
 {
     fill();
@@ -789,8 +846,6 @@ TEST_F(Model, ReadsAloudAgainBehindARestoringThatFailed)
 
     EXPECT_EQ(heard().types, Types{ChangeContext::DataModelChanged});
 }
-
-// --------------------------------------------------------------------------------------------------------- commands
 
 class NamedCommand : public core::DataModelChangeCommand {
 public:

@@ -68,8 +68,6 @@ double speedOf(std::int32_t sourceFrames, std::int32_t destinationFrames)
     return event.motionSpeed();
 }
 
-// ---------------------------------------------------------------------------------------------------- construction
-
 TEST(EventBase, ANewEventHasTheDefaultsAndFlawZeroAlone)
 {
     const EventBase event;
@@ -214,8 +212,6 @@ TEST(EventBase, ACopyHasNoListenersAndAssignmentKeepsThoseOfTheTargetInSilence)
     EXPECT_TRUE(sourceListener.types.empty());
     EXPECT_EQ(targetListener.types, std::vector<std::int32_t>{ChangeContext::EventChanged});
 }
-
-// ----------------------------------------------------------------------------------------------------------- flaws
 
 TEST(EventBase, FourValidTimecodesLeaveNoFlaw)
 {
@@ -432,8 +428,6 @@ RC_GTEST_PROP(EventBase, AnEventOfValidTimecodesHasFlawTwelveExactlyWhenARangeIs
     RC_ASSERT(event.flaws() == (srcIn > srcOut || dstIn > dstOut ? Flaws{12} : Flaws()));
 }
 
-// ----------------------------------------------------------------------------------------------------- flaw texts
-
 const std::vector<std::pair<std::int32_t, std::string>> FlawMessages = {
     {0, "Detected uninitialized timecode."},
     {2, "Event Number is not a number."},
@@ -448,6 +442,14 @@ const std::vector<std::pair<std::int32_t, std::string>> FlawMessages = {
     {11, "Detected invalid timecode. Mismatch between timecode and project frame rate?"},
     {12, "Detected invalid timecode range."},
 };
+
+TEST(EventFlaw, HasNoMessageOutsideTheTable)
+{
+    EXPECT_EQ(EventFlaw::text(1), L"");
+    EXPECT_EQ(EventFlaw::text(12), L"Detected invalid timecode range.");
+    EXPECT_EQ(EventFlaw::text(13), L"");
+    EXPECT_EQ(EventFlaw::text(-1), L"");
+}
 
 TEST(EventBase, EachFlawHasItsMessageInALineOfItsOwn)
 {
@@ -542,8 +544,6 @@ TEST(EventBase, MessagesNeedAConverter)
     EXPECT_EQ(thrownBy([&] { event.flawsText(); }), Result::NotAvailable);
 }
 
-// ----------------------------------------------------------------------------------------------------------- speed
-
 TEST(EventBase, MotionSpeedIsSourceOverDestination)
 {
     const TestProject project;
@@ -590,6 +590,32 @@ TEST(EventBase, MotionSpeedStaysWhileATimecodeIsInvalid)
 
     event->setSrcOut(Timecode("00:00:05:00"));
     EXPECT_EQ(event->motionSpeed(), 4.0);
+}
+
+TEST(EventBase, MotionSpeedStaysWhileTheRateDoesNotCountFramesAndTheFlawsFollow)
+{
+    TestProject project;
+    const auto event = doubleSpeedEvent();
+    project.framerate = Framerate(24, -1);
+
+    event->setTimecodes(Timecode("00:00:03:00"), Timecode("00:00:01:00"), Timecode("00:00:04:00"),
+                        Timecode("00:00:05:00"));
+    EXPECT_EQ(event->flaws(), Flaws{12});
+    EXPECT_EQ(event->motionSpeed(), 2.0);
+
+    event->setTimecodes(Timecode("00:00:01:00"), Timecode("00:00:05:00"), Timecode("00:00:04:00"),
+                        Timecode("00:00:05:24"));
+    EXPECT_EQ(event->flaws(), (Flaws{11, 12}));
+    EXPECT_EQ(event->motionSpeed(), 2.0);
+
+    event->setTimecodes(Timecode("00:00:01:00"), Timecode("00:00:05:00"), Timecode("00:00:04:00"),
+                        Timecode("00:00:05:00"));
+    EXPECT_EQ(event->flaws(), Flaws());
+    EXPECT_EQ(event->motionSpeed(), 2.0);
+
+    event->setSrcOut(Timecode("00:00:01:00"));
+    EXPECT_EQ(event->flaws(), Flaws());
+    EXPECT_EQ(event->motionSpeed(), 2.0);
 }
 
 RC_GTEST_PROP(EventBase, MotionSpeedDoesNotDependOnWhereTheEventStands, ())
@@ -643,8 +669,6 @@ TEST(EventBase, HasASpeedThatIsCloserThanAHundredth)
     EXPECT_FALSE(event->hasSpeed(1.989));
     EXPECT_FALSE(event->hasSpeed(-2.0));
 }
-
-// --------------------------------------------------------------------------------------------------------- setters
 
 TEST(EventBase, EachSetterStoresItsFields)
 {

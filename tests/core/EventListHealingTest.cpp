@@ -3,6 +3,7 @@
 #include "core/HealedEvent.h"
 #include "core/Settings.h"
 #include "core/Timecode.h"
+#include "tests/core/AmpleTime.h"
 #include "tests/core/EventMaking.h"
 #include "tests/core/RecordingListener.h"
 #include "tests/core/TestProject.h"
@@ -12,6 +13,7 @@
 #include <rapidcheck/gtest.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <iterator>
 #include <memory>
@@ -282,6 +284,74 @@ TEST(EventListHeal, AFailureLeavesTheListDeafToItsEvents)
     list.removeListener(&listener);
 }
 
+namespace {
+
+/// Events made at 30 frames, one of which starts in frame 27, in a project that has come down to 25.
+///
+///     |--a--|   |--lost--|--c--|--d--|
+class HealedAtThirty {
+public:
+    HealedAtThirty()
+    {
+        project.framerate = core::Framerate(25, 0);
+        for (const Event& event : {a, lost, c, d, healed})
+            event->revalidate();
+    }
+
+    TestProject project{core::Framerate(30, 0)};
+    const Event a = makeEvent("A", "01:00:00:00", "01:00:00:10", "00:00:00:00", "00:00:00:10");
+    const Event lost = makeEvent("L", "01:00:00:27", "01:00:01:00", "00:00:00:27", "00:00:01:00");
+    const Event c = makeEvent("C", "01:00:01:00", "01:00:01:10", "00:00:01:00", "00:00:01:10");
+    const Event d = makeEvent("D", "01:00:01:10", "01:00:01:20", "00:00:01:10", "00:00:01:20");
+    const Event healed = healedFrom({d, lost, a, c});
+    EventList list = listOf({healed});
+};
+
+} // namespace
+
+TEST(EventListHeal, ModeNoneGivesBackAlsoAMemberThatHasBecomeInvalid)
+{
+    HealedAtThirty at;
+    ASSERT_TRUE(at.lost->hasFlaw(core::EventFlaw::TimecodeInvalid));
+    ASSERT_TRUE(at.healed->isValid());
+    EXPECT_TRUE(at.list.canHeal(at.list, NoReference, HealMode::None));
+
+    at.list.heal(at.list, NoReference, HealMode::None);
+
+    EXPECT_EQ(at.list.events(), (Events{at.a, at.lost, at.c, at.d}));
+    EXPECT_EQ(numbersOf(at.list), (std::vector<std::uint32_t>{1, 2, 3, 4}));
+}
+
+TEST(EventListHeal, AMemberThatHasBecomeInvalidStaysAsItIsBesideTheOthersThatAreHealedAnew)
+{
+    HealedAtThirty at;
+    EXPECT_TRUE(at.list.canHeal(at.list, NoReference, HealMode::Normal));
+
+    at.list.heal(at.list, NoReference, HealMode::Normal);
+
+    ASSERT_EQ(at.list.size(), 3u);
+    EXPECT_EQ(at.list.eventAt(0), at.a);
+    EXPECT_EQ(at.list.eventAt(1), at.lost);
+    EXPECT_EQ(membersOf(at.list.at(2)), (Events{at.c, at.d}));
+    EXPECT_EQ(at.list.at(2).rollName(), "Healed Event 001");
+    EXPECT_EQ(numbersOf(at.list), (std::vector<std::uint32_t>{1, 2, 3}));
+    EXPECT_EQ(timecodesOf(*at.lost), "01:00:00:27 01:00:01:00 00:00:00:27 00:00:01:00");
+}
+
+TEST(EventListCanHeal, AMemberThatHasBecomeInvalidCounts)
+{
+    HealedAtThirty at;
+    const Event withTwo = healedFrom({at.a, at.lost});
+    ASSERT_TRUE(withTwo->isValid());
+    const EventList list = listOf({withTwo, at.c, at.d});
+
+    EXPECT_TRUE(list.canHeal(listOf({withTwo}), NoReference, HealMode::None));
+    EXPECT_TRUE(list.canHeal(listOf({withTwo}), NoReference, HealMode::Normal));
+    // Three before, and three behind: a, the invalid one, and c joined to d.
+    EXPECT_FALSE(list.canHeal(list, NoReference, HealMode::Normal));
+    EXPECT_TRUE(list.canHeal(list, NoReference, HealMode::None));
+}
+
 TEST(EventListCanHeal, SaysWhetherTheNumberOfEventsWouldChange)
 {
     const TestProject project;
@@ -380,6 +450,30 @@ TEST(EventListCanHeal, ChangesNothingAndSendsNothing)
     c->setClipName("still heard");
     EXPECT_EQ(listener.types.size(), 1u);
     list.removeListener(&listener);
+}
+
+TEST(EventListHealingSpeed, ManyHealedEventsAreHealedAnewAndTakenApartInTime)
+{
+    constexpr double AmpleSeconds = IsSanitized ? 30.0 : 5.0;
+    constexpr int Many = 20000;
+    const TestProject project;
+    EventList list;
+    for (int i = 0; i < Many; ++i)
+        list.add(healedFrom({stretch(5 * i, 2), stretch(5 * i + 2, 2)}));
+    bool canHeal = true;
+    bool canTakeApart = false;
+
+    EXPECT_LT(secondsOf([&] { canHeal = list.canHeal(list, NoReference, HealMode::Normal); }), AmpleSeconds);
+    EXPECT_LT(secondsOf([&] { canTakeApart = list.canHeal(list, NoReference, HealMode::None); }), AmpleSeconds);
+    EXPECT_LT(secondsOf([&] { list.heal(list, NoReference, HealMode::Normal); }), AmpleSeconds);
+    EXPECT_FALSE(canHeal);
+    EXPECT_TRUE(canTakeApart);
+    EXPECT_EQ(list.size(), std::size_t{Many});
+    EXPECT_EQ(list.at(Many - 1).rollName(), "Healed Event 20000");
+
+    EXPECT_LT(secondsOf([&] { list.heal(list, NoReference, HealMode::None); }), AmpleSeconds);
+    EXPECT_EQ(list.size(), std::size_t{2 * Many});
+    EXPECT_EQ(list.at(2 * Many - 1).eventNumber(), std::uint32_t{2 * Many});
 }
 
 RC_GTEST_PROP(EventListCanHeal, AgreesWithHealOnTheNumberOfEvents, ())

@@ -1,6 +1,7 @@
 #include "core/EventList.h"
 
 #include "core/HealedEvent.h"
+#include "core/serialize/ByteArchive.h"
 #include "tests/core/EventMaking.h"
 #include "tests/core/RecordingListener.h"
 #include "tests/core/TestProject.h"
@@ -12,10 +13,10 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
-#include <functional>
 #include <limits>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::tests {
@@ -96,8 +97,6 @@ protected:
     RecordingListener listener;
 };
 
-// --------------------------------------------------------------------------------------------- construction, reading
-
 TEST(EventList, ANewListIsEmptyAndOfTheGivenKind)
 {
     EXPECT_TRUE(EventList(0).isEmpty());
@@ -153,8 +152,6 @@ TEST(EventList, IsReadableWhenAnEventHasNoneOfTheFlawsOneToTen)
     EXPECT_TRUE(listOf({flawed(4), named("A")}).hasReadableEvent());
 }
 
-// ------------------------------------------------------------------------------------------------- copy, assignment
-
 TEST_F(ThreeEvents, AreSharedWithACopyWhichIsOfKindTwoAndHasNoListeners)
 {
     EventList copy(list);
@@ -203,6 +200,29 @@ TEST_F(ThreeEvents, MoveTheListeningWhenTheyAreReplacedByAssignment)
     EXPECT_EQ(timesHeard(a), 0U);
 }
 
+TEST_F(ThreeEvents, MayBeReplacedByTheMembersOfAHealedEventThatTheListAloneHolds)
+{
+    const TestProject project;
+    const auto first = playing("00:00:01:00", "00:00:02:00");
+    const auto second = playing("00:00:02:00", "00:00:03:00");
+    auto holder = std::make_shared<HealedEvent>();
+    holder->addEvent(first);
+    holder->addEvent(second);
+    const std::weak_ptr<HealedEvent> watch = holder;
+    const HealedEvent& healed = *holder;
+    list.add(std::move(holder));
+    listener.forget();
+
+    list = healed.healedEvents();
+
+    EXPECT_TRUE(watch.expired());
+    EXPECT_EQ(list.events(), (Events{first, second}));
+    EXPECT_EQ(listener.listKinds, Kinds{1});
+    EXPECT_TRUE(isHeard(first));
+    EXPECT_TRUE(isHeard(second));
+    EXPECT_EQ(timesHeard(a), 0U);
+}
+
 TEST_F(ThreeEvents, StayOnSelfAssignmentWithoutANotification)
 {
     const EventList& itself = list;
@@ -223,8 +243,6 @@ TEST_F(ThreeEvents, DoNotReachAListThatIsGone)
     EXPECT_TRUE(isHeard(a));
     EXPECT_TRUE(isHeard(b));
 }
-
-// ------------------------------------------------------------------------------------------------------ notification
 
 TEST_F(ThreeEvents, AreReannouncedAsOneChangeOfTheListWithItsKind)
 {
@@ -280,8 +298,6 @@ TEST(EventList, AListThatIsHeardByAListIsNotTakenForAnEvent)
     inner.removeListener(&outer);
 }
 
-// --------------------------------------------------------------------------------------------------------------- add
-
 TEST_F(ThreeEvents, GrowByOneWithOneNotification)
 {
     const auto d = named("D");
@@ -302,7 +318,24 @@ TEST_F(ThreeEvents, MayHoldTheSameEventTwiceAndHearItOnce)
     EXPECT_TRUE(isHeard(a));
 }
 
-// ------------------------------------------------------------------------------------------------------------ append
+TEST_F(ThreeEvents, AreAddedByReferenceToTheirOwnPlace)
+{
+    for (int i = 0; i < 20; ++i)
+        list.add(list.events().front());
+
+    EXPECT_EQ(list.size(), 23U);
+    EXPECT_EQ(list.eventAt(22), a);
+    EXPECT_TRUE(isHeard(a));
+}
+
+TEST_F(ThreeEvents, AreNotJoinedByNone)
+{
+    EXPECT_EQ(thrownBy([&] { list.add(nullptr); }), Result::InvalidArgument);
+
+    EXPECT_EQ(list.events(), (Events{a, b, c}));
+    EXPECT_TRUE(listener.types.empty());
+    EXPECT_TRUE(isHeard(c));
+}
 
 TEST_F(ThreeEvents, AreJoinedByAllOfAnotherList)
 {
@@ -394,8 +427,6 @@ TEST_F(ThreeEvents, AreAnnouncedAgainWhenAnEmptyListIsAppended)
     EXPECT_EQ(list.size(), 3U);
 }
 
-// ------------------------------------------------------------------------------------------------------------- erase
-
 TEST_F(ThreeEvents, LoseTheOneInTheMiddle)
 {
     list.erase(1, 1);
@@ -439,8 +470,6 @@ TEST_F(ThreeEvents, StillHearAnEventOfWhichOneOfTwoEntriesIsErased)
     EXPECT_EQ(list.events(), (Events{b, c, a}));
     EXPECT_TRUE(isHeard(a));
 }
-
-// ------------------------------------------------------------------------------------------------------------ remove
 
 TEST_F(ThreeEvents, LoseThoseThatTheOtherListHolds)
 {
@@ -508,8 +537,6 @@ RC_GTEST_PROP(EventList, RemovingKeepsTheOrderOfTheRest, ())
     RC_ASSERT(list.events() == expected);
 }
 
-// ------------------------------------------------------------------------------------------------- clear and copyFrom
-
 TEST_F(ThreeEvents, AreAllClearedWithOneNotification)
 {
     list.clear();
@@ -576,8 +603,6 @@ TEST(EventList, TheCopyOfAHealedEventKeepsItsKindAndLosesItsMembers)
     EXPECT_EQ(timecodesOf(list.at(0)), timecodesOf(*healed));
 }
 
-// ------------------------------------------------------------------------------------------------------------- ranges
-
 TEST(EventList, TheRangeGoesFromTheEarliestStartToTheLatestEndOnEachSide)
 {
     const TestProject project;
@@ -641,8 +666,6 @@ TEST(EventList, AnEmptyListHasNoRange)
     EXPECT_EQ(thrownBy([] { EventList().sourceRange(); }), Result::NotAvailable);
     EXPECT_EQ(thrownBy([] { EventList().destinationRange(); }), Result::NotAvailable);
 }
-
-// -------------------------------------------------------------------------------------------------------------- shift
 
 TEST(EventList, ShiftingTheDestinationMovesBothEndsOfItsEventsAndLeavesTheSource)
 {
@@ -740,6 +763,48 @@ TEST(EventList, ShiftingAnEmptyListDoesNothing)
     EXPECT_TRUE(list.isEmpty());
 }
 
+TEST(EventList, AShiftThatFailsHalfwayKeepsWhatItMovedAndLeavesTheListDeaf)
+{
+    TestProject project(Framerate(30, 0));
+    const auto first = playing("00:00:10:00", "00:00:11:00");
+    const auto second = playing("00:00:20:00", "00:00:20:29");
+    const auto third = playing("00:00:30:00", "00:00:31:00");
+    EventList list = listOf({first, second, third});
+    RecordingListener listener;
+    list.addListener(&listener);
+    project.framerate = Framerate(25, 0);
+
+    EXPECT_EQ(thrownBy([&] { list.shiftDestination(Timecode("00:00:01:00"), true); }), Result::FrameOutOfRate);
+
+    EXPECT_EQ(timecodesOf(*first), "00:10:00:00 00:10:01:00 00:00:11:00 00:00:12:00");
+    EXPECT_EQ(timecodesOf(*second), "00:10:00:00 00:10:01:00 00:00:20:00 00:00:20:29");
+    EXPECT_EQ(timecodesOf(*third), "00:10:00:00 00:10:01:00 00:00:30:00 00:00:31:00");
+    for (const auto& event : {first, second, third})
+        event->setRollName("not heard");
+    EXPECT_TRUE(listener.types.empty());
+
+    list.setListening(true);
+    first->setRollName("heard");
+    EXPECT_EQ(listener.types.size(), 1U);
+}
+
+TEST_F(ThreeEvents, AreGoneAndNothingIsHeardAfterAReadingThatBreaksOff)
+{
+    const TestProject project;
+    core::serialize::ByteArchive whole;
+    whole << listOf({playing("00:00:01:00", "00:00:02:00"), playing("00:00:02:00", "00:00:03:00")});
+    core::serialize::ByteArchive brokenOff;
+    brokenOff.assign(whole.data(), whole.size() - 1);
+
+    EXPECT_EQ(thrownBy([&] { brokenOff >> list; }), Result::EndOfData);
+
+    EXPECT_TRUE(listener.types.empty());
+    EXPECT_FALSE(list.contains(a));
+    EXPECT_EQ(timesHeard(a), 0U);
+    for (const auto& event : list.events())
+        EXPECT_EQ(timesHeard(event), 0U);
+}
+
 TEST(EventList, HearsItsEventsAfterAShift)
 {
     const TestProject project;
@@ -774,8 +839,6 @@ RC_GTEST_PROP(EventList, AShiftMovesEachEventByTheFramesOfItsOffset, ())
         RC_ASSERT(list.at(i).dstIn().toFrameCount() == 2 * starts[i]);
     }
 }
-
-// -------------------------------------------------------------------------------------------------------------- merge
 
 class Merging : public testing::Test {
 protected:

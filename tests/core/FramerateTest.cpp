@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdint>
+#include <limits>
 #include <string_view>
 
 namespace cadrel::tests {
@@ -89,6 +90,19 @@ TEST(Framerate, DropFrameExistsAtThirtyNominalFramesOnly)
     EXPECT_EQ(thrownBy([] { Framerate framerate(25, 1); }), Result::NotSupported);
     EXPECT_EQ(thrownBy([] { Framerate framerate(60, true, 1); }), Result::NotSupported);
     EXPECT_EQ(thrownBy([] { Framerate framerate(30, true, 1); }), Result::Ok);
+}
+
+TEST(Framerate, ADayOfMoreFramesThanCanBeCountedOrOfLessThanNoneFails)
+{
+    constexpr std::int32_t Highest = std::numeric_limits<std::int32_t>::max();
+    constexpr std::int32_t Lowest = std::numeric_limits<std::int32_t>::min();
+
+    // 86400 seconds of 24855 frames are 2147472000 frames, of one frame more 2147558400; 2147483647 can be counted.
+    EXPECT_EQ(Framerate(24855, 0).lastFrame, 2147471999);
+    for (const std::int32_t rate : {24856, Highest, -1, Lowest}) {
+        EXPECT_EQ(thrownBy([=] { Framerate framerate(rate, 0); }), Result::OutOfRange) << rate;
+        EXPECT_EQ(thrownBy([=] { Framerate framerate(rate, true, 0); }), Result::OutOfRange) << rate;
+    }
 }
 
 TEST(Framerate, UpdatesTheLastFrameForChangedFields)

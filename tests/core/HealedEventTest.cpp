@@ -45,6 +45,21 @@ TEST(HealedEvent, TakesTheTimecodesOfItsFirstMember)
     EXPECT_EQ(healed.healedEvents().eventAt(0), member);
 }
 
+TEST(HealedEvent, TakesAMemberByReferenceToItsOwnPlace)
+{
+    const TestProject project;
+    const auto member = makeEvent("A", "00:00:01:00", "00:00:03:00", "00:00:04:00", "00:00:05:00");
+    HealedEvent healed;
+    healed.addEvent(member);
+
+    for (int i = 0; i < 20; ++i)
+        healed.addEvent(healed.healedEvents().events().front());
+
+    ASSERT_EQ(healed.healedEvents().size(), 21U);
+    EXPECT_EQ(healed.healedEvents().eventAt(20), member);
+    EXPECT_EQ(timecodesOf(healed), "00:00:01:00 00:00:03:00 00:00:04:00 00:00:05:00");
+}
+
 TEST(HealedEvent, SpansItsMembersAndTheGapBetweenThem)
 {
     const TestProject project;

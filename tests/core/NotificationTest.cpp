@@ -2,6 +2,8 @@
 #include "core/ChangeContextListenerInterface.h"
 #include "core/ChangeContextNotificationBase.h"
 
+#include "core/EventBase.h"
+#include "core/EventList.h"
 #include "tests/core/RecordingListener.h"
 #include "tests/core/ThrownResult.h"
 #include "util/Result.h"
@@ -9,7 +11,10 @@
 #include <gtest/gtest.h>
 
 #include <array>
+#include <cstdint>
 #include <functional>
+#include <memory>
+#include <optional>
 #include <utility>
 #include <vector>
 
@@ -169,6 +174,74 @@ TEST(Notification, GoesInTheOrderOfTheListenersAddresses)
     notifier.notify(SettingsChange);
 
     EXPECT_EQ(order, (std::vector<int>{0, 1, 2}));
+}
+
+TEST(Notification, ReachesEachListenerOnceInOrderAlsoWhereOthersComeAndGoMeanwhile)
+{
+    using cadrel::core::EventList;
+    std::vector<int> order;
+    EventList list;
+    const auto event = std::make_shared<cadrel::core::EventBase>();
+    list.add(event);
+    // Temporary lists listen to the event from addresses before, between and behind those of its listeners.
+    struct Neighbours {
+        std::optional<EventList> before;
+        ActingListener first;
+        std::optional<EventList> between;
+        ActingListener second;
+        std::optional<EventList> behind;
+        ActingListener third;
+    };
+    Neighbours at;
+    const auto actAs = [&](int number) {
+        return ActingListener([&, number] {
+            order.push_back(number);
+            for (std::optional<EventList>* place : {&at.before, &at.between, &at.behind})
+                place->emplace(list);
+            for (std::optional<EventList>* place : {&at.behind, &at.before, &at.between})
+                place->reset();
+            const EventList onTheStack(list);
+            const auto onTheHeap = std::make_unique<EventList>(list);
+        });
+    };
+    at.first = actAs(1);
+    at.second = actAs(2);
+    at.third = actAs(3);
+    for (ActingListener* listener : {&at.third, &at.first, &at.second})
+        event->addListener(listener);
+    RecordingListener ofTheList;
+    list.addListener(&ofTheList);
+
+    event->setClipName("changed");
+
+    EXPECT_EQ(order, (std::vector<int>{1, 2, 3}));
+    EXPECT_EQ(ofTheList.types, std::vector<std::int32_t>{ChangeContext::EventListChanged});
+}
+
+TEST(Notification, ReachesEachListenerThatStaysOnceWhereOneRemovesItselfMeanwhile)
+{
+    for (const std::size_t leaving : {0U, 1U, 2U}) {
+        ChangeContextNotificationBase notifier;
+        std::vector<std::size_t> order;
+        std::array<ActingListener, 3> listeners;
+        for (std::size_t i = 0; i < listeners.size(); ++i) {
+            listeners[i] = ActingListener([&, i] {
+                order.push_back(i);
+                if (i == leaving)
+                    notifier.removeListener(&listeners[i]);
+            });
+            notifier.addListener(&listeners[i]);
+        }
+
+        notifier.notify(SettingsChange);
+        EXPECT_EQ(order, (std::vector<std::size_t>{0, 1, 2})) << leaving;
+
+        order.clear();
+        notifier.notify(SettingsChange);
+        std::vector<std::size_t> staying = {0, 1, 2};
+        std::erase(staying, leaving);
+        EXPECT_EQ(order, staying) << leaving;
+    }
 }
 
 TEST(Notification, EndsAtAListenerThatThrows)

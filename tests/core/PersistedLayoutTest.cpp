@@ -13,11 +13,14 @@
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
+#include <cstdlib>
+#include <fstream>
 #include <memory>
 #include <string>
+#include <sys/resource.h>
+#include <unistd.h>
 #include <vector>
 
 // The stored forms of the model, written down byte by byte. Files of every version must stay readable.
@@ -80,8 +83,6 @@ protected:
     TestProject project;
 };
 
-// --------------------------------------------------------------------------------------------------------- Timecode
-
 TEST_F(PersistedLayout, TimecodeIsItsFourFieldsAndItsFlagInOneByteEach)
 {
     EXPECT_EQ(written(Timecode("01:02:03:04")), bytesOf("02 00 00 00  01 02 03 04 01"));
@@ -134,8 +135,6 @@ TEST_F(PersistedLayout, TimecodeThatBreaksOffFailsInEveryVersion)
     EXPECT_EQ(reading(timecode, "01 00 00 00  01 00 00 00 02 00 00 00 03 00 00 00 04 00 00 00"), Result::EndOfData);
     EXPECT_EQ(reading(timecode, "00 00 00 00  01 00 00 00 02 00 00 00 03 00 00 00 04 00 00"), Result::EndOfData);
 }
-
-// -------------------------------------------------------------------------------------------------------- EventBase
 
 // 00:00:01:00 to 00:00:03:00 over 00:00:04:00 to 00:00:05:00.
 const std::string FourTimecodes = "02 00 00 00 00 00 01 00 01  02 00 00 00 00 00 03 00 01 "
@@ -399,8 +398,6 @@ TEST_F(PersistedLayout, AnEventThatBreaksOffAnywhereFails)
     }
 }
 
-// ------------------------------------------------------------------------------------- HealedEvent and its members
-
 /// The list with one event that a healed event holds as its members, framed.
 std::string listOfOne(const std::string& kind, const std::string& event)
 {
@@ -513,6 +510,23 @@ TEST_F(PersistedLayout, AFailureDeepWithinLeavesTheFullDepthToTheNextReading)
     EXPECT_EQ(reading(healed, nestedHealedEvents(8)), Result::Ok);
 }
 
+TEST_F(PersistedLayout, WhatCouldNotBeReadBackIsNotWritten)
+{
+    auto healed = std::make_shared<HealedEvent>();
+    for (int depth = 2; depth <= 8; ++depth) {
+        const auto around = std::make_shared<HealedEvent>();
+        around->addEvent(healed);
+        healed = around;
+    }
+    HealedEvent nineDeep;
+    nineDeep.addEvent(healed);
+    HealedEvent copy;
+
+    EXPECT_EQ(reading(copy, written(*healed)), Result::Ok);
+    EXPECT_EQ(thrownBy([&] { written(nineDeep); }), Result::CorruptData);
+    EXPECT_EQ(written(*healed), written(copy));
+}
+
 TEST_F(PersistedLayout, ThousandsOfNestedHealedEventsAreRefusedAtOnce)
 {
     const std::vector<std::uint8_t> around =
@@ -524,8 +538,6 @@ TEST_F(PersistedLayout, ThousandsOfNestedHealedEventsAreRefusedAtOnce)
 
     EXPECT_EQ(reading(healed, bytes), Result::CorruptData);
 }
-
-// -------------------------------------------------------------------------------------------------------- EventList
 
 TEST_F(PersistedLayout, AnEmptyListIsEightBytesOfZero)
 {
@@ -544,6 +556,20 @@ TEST_F(PersistedLayout, AListIsItsEventsWithTheKindOfEach)
                               "01 00 00 00  00 00 00 00  00 00 00 00  00 00 00 00 " + NoText + NoText + "00 ";
 
     EXPECT_EQ(written(list), bytesOf("00 00 00 00  02 00 00 00 " + PlainKind + event + HealedKind + event + EmptyList));
+}
+
+TEST_F(PersistedLayout, AMemberlessCopyOfAHealedEventIsWrittenSoThatItReadsBack)
+{
+    EventList healed;
+    healed.add(std::make_shared<HealedEvent>());
+    EventList copies;
+    copies.copyFrom(healed);
+    ASSERT_EQ(copies.at(0).eventKind(), 1);
+    EventList list;
+
+    EXPECT_EQ(reading(list, written(copies)), Result::Ok);
+
+    EXPECT_EQ(list.size(), 1U);
 }
 
 TEST_F(PersistedLayout, AListReadsPlainAndHealedEventsInPlaceOfItsOwn)
@@ -622,8 +648,6 @@ TEST_F(PersistedLayout, AListOfAnotherVersionIsNewer)
 
     EXPECT_EQ(reading(list, "01 00 00 00  00 00 00 00"), Result::NewerVersion);
 }
-
-// -------------------------------------------------------------------------------------------------------- DataModel
 
 const std::string EmptyRow = "00 00 00 00 " + NoText + NoText + "00 ";
 const std::string DefaultSettings = "04 00 00 00 "
@@ -713,6 +737,42 @@ TEST_F(PersistedLayout, APropertyCountBeyondTheDataFails)
     DataModel model;
 
     EXPECT_EQ(reading(model, "01 00 00 00 " + ThreeEmptyLists + LargestCount), Result::EndOfData);
+}
+
+/// Leaves this process 512 MB beyond what it has already.
+void limitMemory()
+{
+    std::size_t pages = 0;
+    std::ifstream("/proc/self/statm") >> pages;
+    const rlim_t limit = pages * static_cast<std::size_t>(sysconf(_SC_PAGESIZE)) + (512U << 20U);
+    const rlimit both{limit, limit};
+    ASSERT_EQ(setrlimit(RLIMIT_AS, &both), 0);
+}
+
+TEST(HostileCountDeathTest, NoCountMakesAReaderTakeMemoryForWhatIsNotThere)
+{
+    const TestProject project;
+    const std::string lists = "01 00 00 00 " + ThreeEmptyLists;
+    const auto allAreRefused = [&] {
+        EventBase event;
+        EventList list;
+        DataModel model;
+        return reading(event, eventWithFlaws(LargestCount)) == Result::EndOfData &&
+               reading(event, "02 00 00 00 " + FourTimecodes + NumberSeven + LargestCount) == Result::EndOfData &&
+               reading(list, "00 00 00 00 " + LargestCount + PlainKind) == Result::EndOfData &&
+               reading(model, lists + LargestCount) == Result::EndOfData &&
+               reading(model, lists + NoProperties + "04 00 00 00  00 00 00 00 00 00 00 00 00 00 00 00 " +
+                                  "00 00 00 00 00 00 " + LargestCount) == Result::EndOfData &&
+               reading(model, lists + NoProperties + DefaultSettings + "00 00 00 00 " + LargestCount) ==
+                   Result::EndOfData;
+    };
+
+    EXPECT_EXIT(
+        {
+            limitMemory();
+            std::_Exit(allAreRefused() ? 0 : 1);
+        },
+        testing::ExitedWithCode(0), "");
 }
 
 TEST_F(PersistedLayout, AModelOfVersionZeroHasNoVideoListAndKeepsItsOwn)
@@ -829,8 +889,6 @@ RC_GTEST_PROP(PersistedModel, ChangedBytesNeverDoWorseThanAResult, ())
               result == Result::NewerVersion || result == Result::UnknownVersion || result == Result::NotSupported);
     RC_ASSERT(result == Result::Ok || model.oldEdl().isEmpty());
 }
-
-// ------------------------------------------------------------------------------------------------------- round trip
 
 std::shared_ptr<EventBase> anyEvent(int depth)
 {

@@ -6,14 +6,11 @@
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
-#include <cmath>
 #include <cstdint>
 #include <limits>
 #include <regex>
 #include <string>
 #include <string_view>
-#include <type_traits>
-#include <vector>
 
 namespace cadrel::tests {
 namespace {
@@ -54,8 +51,6 @@ Result::Type parsing(const char* text)
 {
     return thrownBy([&] { Timecode timecode(text); });
 }
-
-// ---------------------------------------------------------------------------------------------- values and parsing
 
 TEST(Timecode, ADefaultValueIsZeroAndNotInitialized)
 {
@@ -248,8 +243,6 @@ TEST(Timecode, EverySetterInitializes)
     EXPECT_TRUE(byAddition.isInitialized());
 }
 
-// -------------------------------------------------------------------------------------------------------- provider
-
 TEST(Timecode, EveryOperationThatNeedsAProviderFailsWithoutOne)
 {
     Timecode second("00:00:01:00");
@@ -324,8 +317,6 @@ TEST(Timecode, TheLastTimecodeOfTheDayFollowsTheRate)
     project.framerate = dropFrame30();
     EXPECT_EQ(Timecode::maxTimecode().toString(), "23:59:59:29");
 }
-
-// -------------------------------------------------------------------------------------------------------- validity
 
 TEST(Timecode, IsValidUpToTheLastValueOfEachField)
 {
@@ -402,6 +393,15 @@ TEST(Timecode, SecondsAreValidWhenTheyRoundToAFrameOfTheDay)
     EXPECT_FALSE(Timecode::isValidSeconds(86399.981));
 }
 
+TEST(Timecode, ExactlyHalfAFrameBeforeTheDayIsValidAndHalfAFrameBeforeItsEndIsNot)
+{
+    // At 32 frames a second a 64th of a second is exactly half a frame.
+    const TestProject project(Framerate(32, 0));
+
+    EXPECT_TRUE(Timecode::isValidSeconds(-1.0 / 64));
+    EXPECT_FALSE(Timecode::isValidSeconds(86400.0 - 1.0 / 64));
+}
+
 const double NoTimes[] = {std::numeric_limits<double>::quiet_NaN(),
                           std::numeric_limits<double>::infinity(),
                           -std::numeric_limits<double>::infinity(),
@@ -433,8 +433,6 @@ TEST(Timecode, SecondsThatAreNoNumberOrFarOutsideTheDayFailWithOutOfRange)
         EXPECT_EQ(timecode.toString(), "01:02:03:04");
     }
 }
-
-// ---------------------------------------------------------------------------------------------------- frame counts
 
 TEST(Timecode, CountsFramesOfANonDropRate)
 {
@@ -533,6 +531,14 @@ TEST(Timecode, AFrameCountCanNotBeSetInAnUnknownDropFrameState)
     EXPECT_EQ(thrownBy([&] { timecode.setFrameCount(0, Framerate(30, -1)); }), Result::InvalidArgument);
     EXPECT_EQ(thrownBy([&] { timecode.setFrameCount(-1, Framerate(25, -1)); }), Result::InvalidArgument);
     EXPECT_FALSE(timecode.isInitialized());
+}
+
+TEST(Timecode, NoFrameCountCanBeSetUnderARateOfNoFrames)
+{
+    Timecode timecode("01:02:03:04");
+
+    EXPECT_EQ(thrownBy([&] { timecode.setFrameCount(0, Framerate::fromLabel("no rate")); }), Result::OutOfRange);
+    EXPECT_EQ(timecode.toString(), "01:02:03:04");
 }
 
 TEST(Timecode, AnyDropFrameStateButZeroAndOneIsNotSupportedForSetting)
@@ -685,8 +691,6 @@ TEST_P(EveryRate, ASumPastTheLastFrameFails)
     }));
 }
 
-// --------------------------------------------------------------------------------------------------------- seconds
-
 TEST(Timecode, SecondsAreFramesOverTheRealRate)
 {
     // 1800 frames at 30 x 1000/1001 frames a second last 60.06 s.
@@ -768,8 +772,6 @@ TEST(Timecode, AddingSecondsMovesBothWaysWithinTheDay)
     EXPECT_EQ(timecode.toString(), "00:00:00:00");
 }
 
-// ------------------------------------------------------------------------------------------------------ arithmetic
-
 TEST(Timecode, DropFrameSumsSkipTheDroppedNumbers)
 {
     const TestProject project(dropFrame30());
@@ -804,6 +806,18 @@ TEST(Timecode, AnInvalidOperandFailsOnEitherSide)
     EXPECT_EQ(thrownBy([&] { second + Timecode("00:61:00:00"); }), Result::OutOfRange);
 }
 
+TEST(Timecode, OfTwoInvalidOperandsTheFirstOneFails)
+{
+    const TestProject project;
+    const Timecode frameAtTheRate("00:00:00:25");
+    const Timecode frameAboveTheRate("00:00:00:26");
+
+    EXPECT_EQ(thrownBy([&] { frameAtTheRate + frameAboveTheRate; }), Result::OutOfRange);
+    EXPECT_EQ(thrownBy([&] { frameAboveTheRate + frameAtTheRate; }), Result::FrameOutOfRate);
+    EXPECT_EQ(thrownBy([&] { frameAtTheRate - frameAboveTheRate; }), Result::OutOfRange);
+    EXPECT_EQ(thrownBy([&] { frameAboveTheRate - frameAtTheRate; }), Result::FrameOutOfRate);
+}
+
 TEST(Timecode, ASumOfUnsetValuesIsInitializedAndItsOperandsStayAsTheyAre)
 {
     const TestProject project;
@@ -831,8 +845,6 @@ TEST(Timecode, ComparesFieldByFieldAsSignedNumbersWithoutAnyRate)
     EXPECT_TRUE(Timecode("01:00:00:00") == Timecode("01:00:00;00"));
     EXPECT_TRUE(Timecode(1, 2, 3, 4) != Timecode(1, 2, 3, 5));
 }
-
-// ------------------------------------------------------------------------------------------------------ conversion
 
 TEST(Timecode, ConvertingKeepsTheInstantToTheNearestFrame)
 {

@@ -509,6 +509,72 @@ TEST_F(VideoList, ReadsTheFirstOfTwoEntriesAtOneStart)
     EXPECT_EQ(paths(), Paths{"/a/x.mov"});
 }
 
+// NoText at 00:30:00:00, of ten seconds.
+const std::string EntryNoText = "00000000 08000000 2F762FFF2E6D6F76 02000000 00001E00 01 02000000 00000A00 01 ";
+
+class VideoListWithAPathThatIsNoText : public VideoList {
+protected:
+    VideoListWithAPathThatIsNoText()
+    {
+        ByteArchive archive = stored();
+        archive >> list;
+        list.addListener(&listener);
+    }
+
+    static ByteArchive stored() { return archiveOf("00000000 02000000 " + EntryNoText + EntryX); }
+
+    const std::string NoText = "/v/\xFF.mov";
+    RecordingListener listener;
+};
+
+TEST_F(VideoListWithAPathThatIsNoText, HoldsItAsItIs)
+{
+    ByteArchive archive;
+    archive << list;
+
+    EXPECT_EQ(paths(), (Paths{NoText, "/a/x.mov"}));
+    EXPECT_EQ(list.find(NoText), list.entries().begin());
+    EXPECT_EQ(list.entryAt(Timecode("00:30:00:00")).path, NoText);
+    EXPECT_EQ(bytesOf(archive), bytesOf(stored()));
+}
+
+TEST_F(VideoListWithAPathThatIsNoText, FindsAddsAndRemovesOtherFiles)
+{
+    EXPECT_TRUE(list.containsFile("/elsewhere/x.mov"));
+    EXPECT_FALSE(list.containsFile("/a/y.mov"));
+    EXPECT_EQ(list.add(video("/a/y.mov", "02:00:00:00"), false), Result::Ok);
+    EXPECT_EQ(list.add(video("/b/y.mov", "03:00:00:00"), false), Result::Refused);
+    EXPECT_EQ(list.remove("x.mov"), Result::Ok);
+    EXPECT_EQ(list.remove("x.mov"), Result::Refused);
+
+    EXPECT_EQ(paths(), (Paths{NoText, "/a/y.mov"}));
+    EXPECT_EQ(listener.types, (Types{ChangeContext::VideoListChanged, ChangeContext::VideoListChanged}));
+}
+
+TEST_F(VideoListWithAPathThatIsNoText, MovesAndRemovesItByItsOwnPath)
+{
+    EXPECT_EQ(list.add(video(NoText, "02:00:00:00"), false), Result::Refused);
+
+    list.setStart(NoText, Timecode("02:00:00:00"));
+    EXPECT_EQ(paths(), (Paths{"/a/x.mov", NoText}));
+
+    EXPECT_EQ(list.remove(NoText), Result::Ok);
+    EXPECT_EQ(paths(), Paths{"/a/x.mov"});
+    EXPECT_EQ(listener.types, (Types{ChangeContext::VideoListChanged, ChangeContext::VideoListChanged}));
+}
+
+TEST_F(VideoListWithAPathThatIsNoText, StaysAsItIsWhenAssignedAnEqualList)
+{
+    cadrel::core::VideoList other;
+    ByteArchive archive = stored();
+    archive >> other;
+
+    list = other;
+
+    EXPECT_EQ(paths(), (Paths{NoText, "/a/x.mov"}));
+    EXPECT_EQ(listener.types, Types());
+}
+
 TEST_F(VideoList, IsEmptyAfterACountBelowOne)
 {
     for (const char* hex : {"00000000 00000000", "00000000 FFFFFFFF", "00000000 00000080"}) {

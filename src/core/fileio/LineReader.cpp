@@ -68,9 +68,11 @@ void LineReader::findDelimiter()
 /// Adds a part of the file to the unread text; false at the end of the file.
 bool LineReader::readMore()
 {
-    std::copy(unread().begin(), unread().end(), buffer_.begin());
-    end_ -= begin_;
-    begin_ = 0;
+    if (begin_ > 0) {
+        std::copy(unread().begin(), unread().end(), buffer_.begin());
+        end_ -= begin_;
+        begin_ = 0;
+    }
     // Doubling keeps the time for a line of any length linear.
     if (end_ == buffer_.size())
         buffer_.resize(2 * buffer_.size());

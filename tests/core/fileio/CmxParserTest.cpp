@@ -64,9 +64,15 @@ std::size_t countOf(const std::string& text)
     return EdlReading(text).events.size();
 }
 
+/// What parsing detects, and detecting alone too.
 ShownRate rateOf(const std::string& text)
 {
-    return shown(EdlReading(text).framerate);
+    const TempFolder folder;
+    Framerate detected;
+    EXPECT_EQ(CmxParser().detect(widePath(folder.write("reel.edl", text)), detected), Result::Ok);
+    const ShownRate parsed = shown(EdlReading(text).framerate);
+    EXPECT_EQ(shown(detected), parsed) << text;
+    return parsed;
 }
 
 std::string cutWithFrames(const std::string& frames)
@@ -246,6 +252,15 @@ TEST(CmxParser, ReadsLinesOfAnyLength)
     EXPECT_EQ(reading.events.at(0).comment(), Cut + " " + first + "\n* NAME: " + second);
     EXPECT_EQ(reading.events.at(0).clipName(), second);
     EXPECT_EQ(reading.events.at(1).rollName(), "BX");
+}
+
+TEST(CmxParser, FindsADelimiterFarFromTheStart)
+{
+    const TestProject project;
+    const std::string title = "TITLE: " + std::string(3000000, 'x');
+
+    EXPECT_EQ(OnlyEvent(title + "\r" + Cut + "\r* NAME: A\r")->clipName(), "A");
+    EXPECT_EQ(OnlyEvent(title + "\n" + Cut + "\n* NAME: A\n")->clipName(), "A");
 }
 
 TEST(CmxParser, LosesNoLineAtTheEndsOfItsBuffer)
@@ -868,7 +883,8 @@ std::string anyEdlText()
         "01:00:05:12", "1:2:3;4", "02:00:00:24", "02:00:10:29", "02:00:10:59", "99:99:99:99", "10:00", " ", " ", " ",
         " ", " ", "\t", "\n", "\n", "\n", "\r", "\r\n", "* FROM CLIP NAME: A", "* TO CLIP NAME: B", "NAME:", "*",
         "FCM: DROP FRAME", "FCM: NON-DROP FRAME", "FCM", "\n001 AX V C 01:00:00:00 01:00:05:28 02:00:00:00 02:00:05:00",
-        "\n002 BX V D 012 01:00:00:00 01:00:05:00 02:00:00:00 02:00:05:23\n", std::string(1, '\0'), "\xFF");
+        "\n002 BX V D 012 01:00:00:00 01:00:05:00 02:00:00:00 02:00:05:23\n", "\n003 BX V C 01:00:00:00 01:00:05:47\n",
+        std::string(1, '\0'), "\xFF");
     std::string text;
     for (const std::string& piece : *rc::gen::container<std::vector<std::string>>(part))
         text += piece;

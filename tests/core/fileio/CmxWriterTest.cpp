@@ -423,6 +423,20 @@ TEST(CmxWriter, PutsNoFileInPlaceWhenALaterOneCannotBeOpened)
     EXPECT_EQ(folder.names(), (Names{"reel_1.edl", "reel_2.edl"}));
 }
 
+TEST(CmxWriter, LeavesTheFormerFilesWhenALaterOneCannotBeWritten)
+{
+    const TestProject project;
+    const TempFolder folder;
+    folder.write("reel_1.edl", "former");
+    fs::create_symlink("/dev/full", folder / "reel_2.edl");
+
+    EXPECT_EQ(write(folder / "reel.edl", listOfCuts(1000)), Result::FileAccessFailed);
+
+    EXPECT_EQ(contentOf(folder / "reel_1.edl"), "former");
+    EXPECT_EQ(folder.names(), (Names{"reel_1.edl", "reel_2.edl"}));
+    EXPECT_TRUE(fs::is_symlink(folder / "reel_2.edl"));
+}
+
 TEST(CmxWriter, ReplacesTheFilesOfAFormerSplit)
 {
     const TestProject project;

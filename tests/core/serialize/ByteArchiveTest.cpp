@@ -12,6 +12,7 @@
 #include <limits>
 #include <string>
 #include <type_traits>
+#include <utility>
 #include <vector>
 
 namespace cadrel::tests {
@@ -219,6 +220,22 @@ TEST(ByteArchive, AssignmentOfNothingEmptiesIt)
 
     EXPECT_EQ(archive.size(), 0U);
     EXPECT_EQ(archive.data(), nullptr);
+}
+
+TEST(ByteArchive, HasNothingLeftOnceItIsMovedFrom)
+{
+    ByteArchive archive = archiveOf("05 06 07");
+    std::uint8_t value = 0;
+    archive >> value;
+
+    ByteArchive moved = std::move(archive);
+
+    EXPECT_EQ(archive.bytesLeft(), 0U);
+    EXPECT_FALSE(archive.hasBytes(1));
+    EXPECT_EQ(thrownBy([&] { archive >> value; }), Result::EndOfData);
+    moved >> value;
+    EXPECT_EQ(value, 6);
+    EXPECT_EQ(moved.bytesLeft(), 1U);
 }
 
 TEST(ByteArchive, HasBytesUpToTheLastOneAndNeverMore)
