@@ -2,6 +2,7 @@
 
 #include "core/EventBase.h"
 #include "core/EventList.h"
+#include "core/HealedEvent.h"
 
 #include <algorithm>
 #include <iterator>
@@ -12,6 +13,7 @@ using core::EventBase;
 using core::EventFlaw;
 using core::EventList;
 using core::Framerate;
+using core::HealedEvent;
 
 namespace {
 
@@ -27,19 +29,31 @@ bool startsEarlier(const Stretch& a, const Stretch& b)
     return a.start < b.start;
 }
 
-/// The stretches of all events that fill a part of the programme, sorted by their starts.
+/// Whether an event fills a part of the programme.
+bool fillsProgramme(const EventBase& event, const Framerate& framerate)
+{
+    const bool hasTimes = event.dstIn().isInitialized() && event.dstOut().isInitialized() &&
+                          event.dstIn().isValid(framerate) && event.dstOut().isValid(framerate);
+    return hasTimes && event.dstIn() < event.dstOut() && !event.hasFlaw(EventFlaw::NotVideoEvent);
+}
+
+void addStretches(const EventList& events, const Framerate& framerate, std::vector<Stretch>& stretches)
+{
+    for (const auto& event : events.events()) {
+        if (const auto* healed = dynamic_cast<const HealedEvent*>(event.get()))
+            addStretches(healed->healedEvents(), framerate, stretches);
+        else if (fillsProgramme(*event, framerate))
+            stretches.push_back(
+                {event->dstIn().toFrameCount(framerate), event->dstOut().toFrameCount(framerate), event.get()});
+    }
+}
+
+/// The stretches of all events, of healed ones those of their members, sorted by their starts.
 std::vector<Stretch> stretchesOf(const EventList& events, const Framerate& framerate)
 {
     std::vector<Stretch> stretches;
     stretches.reserve(events.size());
-    for (const auto& event : events.events()) {
-        const bool hasTimes = event->dstIn().isInitialized() && event->dstOut().isInitialized() &&
-                              event->dstIn().isValid(framerate) && event->dstOut().isValid(framerate);
-        if (hasTimes && event->dstIn() < event->dstOut() && !event->hasFlaw(EventFlaw::NotVideoEvent)) {
-            stretches.push_back(
-                {event->dstIn().toFrameCount(framerate), event->dstOut().toFrameCount(framerate), event.get()});
-        }
-    }
+    addStretches(events, framerate, stretches);
     std::stable_sort(stretches.begin(), stretches.end(), startsEarlier);
     return stretches;
 }

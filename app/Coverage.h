@@ -24,7 +24,8 @@ struct Insert {
 };
 
 /// How much of the new programme the change list carries over, counted in frames. The programme is what the picture
-/// events with readable times fill, whatever else is wrong with them: their sound is missing all the same.
+/// events with readable times fill, whatever else is wrong with them: their sound is missing all the same. A healed
+/// event carries over what its members do; an insert that it was healed over stays an insert.
 ///
 ///     new programme   |---- A ----|---- B ----|  |--- C ---|
 ///     change list     |-- 1 --|       |-- 2 --|

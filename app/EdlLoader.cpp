@@ -59,12 +59,6 @@ bool saysDropFrame(std::string_view line)
            line.find("NON-DROP FRAME") == std::string_view::npos;
 }
 
-bool isUnreadableForSoundAlone(EventBase event)
-{
-    event.removeFlaw(EventFlaw::NotVideoEvent);
-    return !event.hasFormatFlaw();
-}
-
 /// Whether a frames field of the event is beyond the rate.
 bool exceeds(const EventBase& event, std::int32_t framesPerSecond)
 {
@@ -87,6 +81,7 @@ Framerate EdlLoader::chooseRate(const std::string& firstFile) const
     const ProjectFramerate anyRate(Framerate(60, 0));
     LoadedEdl edl{firstFile, core::EventList(), {}};
     load(edl);
+    refuseUnreadable(edl);
     throw Failure{firstFile, "shows no frame rate", "give it with --rate, such as --rate \"24 fps\""};
 }
 
@@ -105,6 +100,15 @@ std::list<LoadedEdl> EdlLoader::load(const std::vector<std::string>& files) cons
     return edls;
 }
 
+void EdlLoader::refuseUnreadable(const LoadedEdl& edl)
+{
+    if (edl.events.hasReadableEvent())
+        return;
+    const std::string flaws = StringUtil::trim(edl.events.at(0).flawsText());
+    throw Failure{edl.path, "holds no event that can be read (the first: " + flaws.substr(0, flaws.find('\n')) + ")",
+                  "give the CMX EDL of a picture track"};
+}
+
 void EdlLoader::load(LoadedEdl& edl) const
 {
     const std::wstring path = toWide(edl.path);
@@ -116,14 +120,6 @@ void EdlLoader::load(LoadedEdl& edl) const
     }
     if (edl.events.isEmpty())
         throw Failure{edl.path, "holds no events", "give a CMX EDL"};
-    if (!edl.events.hasReadableEvent()) {
-        const EventBase& first = edl.events.at(0);
-        const std::string flaws = StringUtil::trim(first.flawsText());
-        throw Failure{edl.path,
-                      "holds no event that can be read (the first: " + flaws.substr(0, flaws.find('\n')) + ")",
-                      isUnreadableForSoundAlone(first) ? "give the EDL of a picture track, or list it with --audio"
-                                                       : "give a CMX EDL"};
-    }
 }
 
 void EdlLoader::checkRate(const LoadedEdl& edl) const

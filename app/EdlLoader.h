@@ -34,8 +34,11 @@ public:
     core::Framerate chooseRate(const std::string& firstFile) const;
 
     /// Reads the files in order under the rate of the installed ProjectFramerate; a file that is named twice is read
-    /// once. Throws Failure for what can't be read, holds no events, or none that are readable.
+    /// once. Throws Failure for what can't be read or holds no events.
     std::list<LoadedEdl> load(const std::vector<std::string>& files) const;
+
+    /// Throws Failure when no event of the file can be read as picture.
+    static void refuseUnreadable(const LoadedEdl& edl);
 
 private:
     void load(LoadedEdl& edl) const;

@@ -15,6 +15,7 @@ struct Failure {
 /// A command line that can't be meant. Thrown by value; ends the program with status 2.
 struct UsageError {
     std::string problem;
+    std::string remedy = "see --help";
 };
 
 } // namespace cadrel::app

@@ -4,6 +4,7 @@
 #include "app/EventJson.h"
 #include "app/Failure.h"
 #include "app/GenerationFailure.h"
+#include "app/Interruption.h"
 #include "app/JsonOutput.h"
 #include "app/Paths.h"
 #include "app/Printable.h"
@@ -110,8 +111,9 @@ void configure(Settings& settings, const GenerateOptions& options)
 std::vector<std::string> loadSide(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)
 {
     std::vector<std::string> names;
-    for (const LoadedEdl& edl : loader.load(files)) {
-        events.append(edl.events);
+    for (LoadedEdl& edl : loader.load(files)) {
+        EdlLoader::refuseUnreadable(edl);
+        events.append(edl.events.release());
         names.push_back(fileNameOf(edl.path));
     }
     return names;
@@ -278,12 +280,12 @@ std::string toText(const Report& report, const GenerateOptions& options)
            "\n";
 }
 
-void saveChangeEdl(const EventList& changeEvents, const std::string& path)
+void saveChangeEdl(const EventList& changeEvents, const std::string& path, const std::vector<std::string>& files)
 {
     try {
         changeEvents.save(toWide(path));
     } catch (const Result::Type&) {
-        throw unwritable(path);
+        throw unwritable(files);
     }
 }
 
@@ -315,6 +317,9 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     checkOutputs(options, report.changeFiles);
 
     terminal.showProgress("writing");
+    std::optional<Interruption> interruption;
+    if (!report.changeFiles.empty() || writesJsonFile(options))
+        interruption.emplace();
     std::optional<JsonOutput> json;
     if (!options.jsonFile.empty()) {
         json.emplace(options.jsonFile);
@@ -322,7 +327,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
         json->finish();
     }
     if (!options.changeFile.empty())
-        saveChangeEdl(model.changeEdl(), options.changeFile);
+        saveChangeEdl(model.changeEdl(), options.changeFile, report.changeFiles);
     if (json)
         json->keep();
 

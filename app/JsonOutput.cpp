@@ -1,6 +1,7 @@
 #include "app/JsonOutput.h"
 
 #include "app/Failure.h"
+#include "app/Interruption.h"
 #include "app/Paths.h"
 #include "util/FilePath.h"
 #include "util/Result.h"
@@ -16,37 +17,35 @@ JsonOutput::JsonOutput(const std::string& path) : path_(path)
     if (isStandardOutput(path))
         return;
     const auto target = util::toFilePath(toWide(path));
+    orUnwritable([&] { file_.emplace(target); });
+}
+
+/// Does what fails when the file can't be written.
+template <class Action>
+void JsonOutput::orUnwritable(Action action)
+{
     try {
-        file_.emplace(target);
+        action();
     } catch (const Result::Type&) {
-        throw unwritable(path_);
+        throw unwritable({path_});
     }
 }
 
 void JsonOutput::write(std::string_view text)
 {
-    if (!file_) {
+    Interruption::check();
+    if (file_)
+        orUnwritable([&] { file_->write(text); });
+    else
         std::cout << text;
-        return;
-    }
-    try {
-        file_->write(text);
-    } catch (const Result::Type&) {
-        throw unwritable(path_);
-    }
 }
 
 void JsonOutput::finish()
 {
-    if (!file_) {
+    if (file_)
+        orUnwritable([&] { file_->putInPlace(); });
+    else
         flushStandardOutput();
-        return;
-    }
-    try {
-        file_->putInPlace();
-    } catch (const Result::Type&) {
-        throw unwritable(path_);
-    }
 }
 
 void JsonOutput::keep()

@@ -22,6 +22,9 @@ public:
     void keep();
 
 private:
+    template <class Action>
+    void orUnwritable(Action action);
+
     std::string path_;
     std::optional<util::FileReplacement> file_; ///< nothing for standard output
 };

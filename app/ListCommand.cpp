@@ -3,6 +3,7 @@
 #include "app/EventJson.h"
 #include "app/EventTable.h"
 #include "app/Failure.h"
+#include "app/Interruption.h"
 #include "app/JsonOutput.h"
 #include "app/Paths.h"
 #include "app/ProjectFramerate.h"
@@ -86,6 +87,9 @@ void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const 
     std::vector<std::string> names;
     for (const LoadedEdl& edl : edls)
         names.push_back(fileNameOf(edl.path));
+    std::optional<Interruption> interruption;
+    if (!JsonOutput::isStandardOutput(path))
+        interruption.emplace();
     JsonOutput json(path);
     EventJson::write(allEvents(edls), {{"files", names}, {"rate", rate}},
                      [&json](std::string_view text) { json.write(text); });

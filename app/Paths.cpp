@@ -5,12 +5,20 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <optional>
 #include <system_error>
 #include <unistd.h>
 
 namespace cadrel::app {
 
 namespace fs = std::filesystem;
+
+namespace {
+
+/// Bytes, on the file systems in use.
+constexpr std::size_t LongestName = 255;
+
+} // namespace
 
 std::wstring toWide(const std::string& path)
 {
@@ -38,11 +46,11 @@ bool isSameFile(const std::string& a, const std::string& b)
     return !fullA.empty() && fullA == fullB;
 }
 
-void refuseToOverwrite(const std::vector<std::string>& inputs, const std::string& output)
+void refuseToOverwrite(const std::vector<std::string>& files, const std::string& output)
 {
-    const auto same = [&output](const std::string& input) { return isSameFile(input, output); };
-    if (std::any_of(inputs.begin(), inputs.end(), same))
-        throw UsageError{output + ": writing it would overwrite an input; give another name"};
+    const auto same = [&output](const std::string& file) { return isSameFile(file, output); };
+    if (std::any_of(files.begin(), files.end(), same))
+        throw UsageError{output + ": writing it would overwrite another file of this run", "give another name"};
 }
 
 Failure unreadable(const std::string& path)
@@ -70,24 +78,41 @@ Failure unreadable(const std::string& path)
     return {path, "can't be read to its end", "check the disk or copy the file anew"};
 }
 
-Failure unwritable(const std::string& path)
+namespace {
+
+std::optional<Failure> obstacleToWriting(const std::string& path)
 {
     std::error_code error;
     if (fs::is_directory(path, error))
-        return {path, "is a folder", "give the name of a file in it"};
+        return Failure{path, "is a folder", "give the name of a file in it"};
     const fs::path parent = fs::path(path).parent_path();
     const fs::path folder = parent.empty() ? fs::path(".") : parent;
     if (!fs::exists(folder, error))
-        return {path, "the folder does not exist", "make it or give another"};
+        return Failure{path, "the folder does not exist", "make it or give another"};
     if (!fs::is_directory(folder, error))
-        return {path, "what should be the folder is a file", "give another name"};
+        return Failure{path, "what should be the folder is a file", "give another name"};
+    if (fs::path(path).filename().string().size() > LongestName)
+        return Failure{path, "the name is too long", "give a shorter one"};
     const bool exists = fs::exists(path, error);
     if (exists && access(path.c_str(), W_OK) != 0)
-        return {path, "is protected against writing", "give another name"};
+        return Failure{path, "is protected against writing", "give another name"};
     const bool isReplaced = !exists || fs::is_regular_file(path, error);
     if (isReplaced && access(folder.c_str(), W_OK) != 0)
-        return {path, "you may not write into the folder", "give another folder"};
-    return {path, "can't be written", "see whether the disk is full"};
+        return Failure{path, "you may not write into the folder", "give another folder"};
+    if (!isReplaced)
+        return Failure{path, "can't be written", "see whether the disk is full"};
+    return std::nullopt;
+}
+
+} // namespace
+
+Failure unwritable(const std::vector<std::string>& paths)
+{
+    for (const std::string& path : paths) {
+        if (const std::optional<Failure> obstacle = obstacleToWriting(path))
+            return *obstacle;
+    }
+    return {paths.front(), "can't be written", "see whether the disk is full, or give another name"};
 }
 
 } // namespace cadrel::app

@@ -16,11 +16,11 @@ std::string fileNameOf(const std::string& path);
 /// Whether both paths name one regular file, or would when it is written.
 bool isSameFile(const std::string& a, const std::string& b);
 
-/// Throws UsageError when writing `output` would overwrite one of the inputs.
-void refuseToOverwrite(const std::vector<std::string>& inputs, const std::string& output);
+/// Throws UsageError when writing `output` would overwrite one of the files.
+void refuseToOverwrite(const std::vector<std::string>& files, const std::string& output);
 
-/// Why a file could not be read or written, as far as the file system tells.
+/// Why a file could not be read, or one of several not written, as far as the file system tells.
 Failure unreadable(const std::string& path);
-Failure unwritable(const std::string& path);
+Failure unwritable(const std::vector<std::string>& paths);
 
 } // namespace cadrel::app

@@ -50,7 +50,9 @@ void Terminal::clearProgress()
 
 void Terminal::warn(const Failure& failure)
 {
-    writeLine(toPrintable(failure.file).text + ": warning: " + sentence(failure));
+    const std::string warning = toPrintable(failure.file).text + ": warning: " + sentence(failure);
+    if (warnings_.insert(warning).second)
+        writeLine(warning);
 }
 
 void Terminal::report(const Failure& failure)
@@ -60,7 +62,7 @@ void Terminal::report(const Failure& failure)
 
 void Terminal::report(const UsageError& error)
 {
-    writeLine(toPrintable(error.problem).text + "; see --help");
+    writeLine(toPrintable(error.problem).text + "; " + error.remedy);
 }
 
 bool Terminal::wantsColour()

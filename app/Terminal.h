@@ -2,6 +2,7 @@
 
 #include "app/Failure.h"
 
+#include <set>
 #include <string>
 
 namespace cadrel::app {
@@ -18,6 +19,7 @@ public:
     void showProgress(const std::string& what);
     void clearProgress();
 
+    /// A warning that has been given is not repeated.
     void warn(const Failure& failure);
     void report(const Failure& failure);
     void report(const UsageError& error);
@@ -30,6 +32,7 @@ private:
 
     bool showsProgress_;
     bool progressShown_ = false;
+    std::set<std::string> warnings_;
 };
 
 } // namespace cadrel::app

@@ -3,6 +3,7 @@
 
 #include "app/Failure.h"
 #include "app/GenerateCommand.h"
+#include "app/Interruption.h"
 #include "app/JsonOutput.h"
 #include "app/ListCommand.h"
 #include "app/PlainStringConverter.h"
@@ -82,6 +83,12 @@ std::int32_t numberOf(const std::string& word, const Words& words)
     return static_cast<std::int32_t>(std::distance(words.begin(), std::find(words.begin(), words.end(), word)));
 }
 
+/// An output without a name is a slip, such as a variable of a script that isn't set.
+std::string isNamed(const std::string& file)
+{
+    return file.empty() ? "the file name is empty" : std::string();
+}
+
 /// The options that say how EDLs are read.
 void addLoadOptions(CLI::App& command, LoadOptions& load)
 {
@@ -119,8 +126,10 @@ CommandLine parse(CLI::App& program, int argc, char** argv)
     generate->add_option("--new", line.generate.newFiles, "EDLs of the new cut, in order")
         ->type_name("FILE")
         ->required();
-    generate->add_option("-o,--output", line.generate.changeFile, "Where to write the change EDL")->type_name("FILE");
-    generate->add_option("--json", line.generate.jsonFile, JsonHelp)->type_name("FILE");
+    generate->add_option("-o,--output", line.generate.changeFile, "Where to write the change EDL")
+        ->check(isNamed)
+        ->type_name("FILE");
+    generate->add_option("--json", line.generate.jsonFile, JsonHelp)->check(isNamed)->type_name("FILE");
     generate->add_option("--match", match, "The name that tells the same material: roll (default) or clip")
         ->check(CLI::IsMember(wordList(MatchWords)))
         ->type_name("NAME");
@@ -141,7 +150,7 @@ CommandLine parse(CLI::App& program, int argc, char** argv)
     list->add_option("FILE", line.list.files, "EDLs to show")->type_name("")->required();
     list->add_flag("--audio", line.list.load.acceptAudio, "Accept audio events, as for a change EDL");
     list->add_flag("--summary", line.list.summary, "Print the totals alone");
-    list->add_option("--json", line.list.jsonFile, JsonHelp)->type_name("FILE");
+    list->add_option("--json", line.list.jsonFile, JsonHelp)->check(isNamed)->type_name("FILE");
     addLoadOptions(*list, line.list.load);
     list->footer(ListHelp);
 
@@ -182,6 +191,8 @@ int runToStatus(int argc, char** argv, Terminal& terminal)
         return WrongUsage;
     } catch (const Failure& failure) {
         terminal.report(failure);
+    } catch (const app::Interruption::Requested&) {
+        terminal.clearProgress();
     } catch (const std::bad_alloc&) {
         terminal.report(Failure{"memory", "there is not enough of it", "split the EDLs or close other programs"});
     } catch (const util::Result::Type& result) {

@@ -110,11 +110,27 @@ TEST(BadInput, AFileWithoutAReadableEvent)
 {
     const TempFolder folder;
 
-    expectRefused(folder.write("sound.edl", "001 AX A C 01:00:00:12 01:00:01:00 01:00:00:00 01:00:00:12\n"),
-                  "holds no event that can be read (the first: Not a video event.); give the EDL of a picture track, "
-                  "or list it with --audio");
-    expectRefused(folder.write("mail.txt", "1 a b c d e f g h i j k\n"),
-                  "holds no event that can be read (the first: Detected uninitialized timecode.); give a CMX EDL");
+    const std::string good = folder.write("good.edl", oldCut());
+    const std::string sound = folder.write("sound.edl", "001 AX A C 01:00:00:12 01:00:01:00 01:00:00:00 01:00:00:12\n");
+    const std::string problem = ": holds no event that can be read (the first: Not a video event.); "
+                                "give the CMX EDL of a picture track";
+
+    expectStopped(runCadrel({"generate", "--old", sound, "--new", good}), sound + problem);
+    expectStopped(runCadrel({"generate", "--old", good, "--new", sound}), sound + problem);
+
+    const Outcome listed = runCadrel({"list", sound});
+    EXPECT_EQ(listed.status, 0);
+    EXPECT_NE(listed.out.find("Not a video event."), std::string::npos) << listed.out;
+}
+
+TEST(BadInput, AFileWithoutAnyTimecode)
+{
+    const TempFolder folder;
+
+    expectRefused(
+        folder.write("mail.txt", "1 a b c d e f g h i j k\n"),
+        "holds no event that can be read (the first: Detected uninitialized timecode.); give the CMX EDL of a "
+        "picture track");
 }
 
 TEST(BadInput, AFileThatShowsNoRate)
@@ -248,6 +264,56 @@ TEST(BadOutput, AFileProtectedAgainstWriting)
 
     expectUnwritable(file, "is protected against writing; give another name", runCadrelUnprivileged);
     EXPECT_EQ(contentOf(file), "former list");
+}
+
+TEST(BadOutput, AnInterruptionLeavesNothingHalfWritten)
+{
+    const TempFolder folder;
+    const std::string document = folder.write("change.json", "former document");
+    std::string text;
+    for (int index = 0; index < 50000; ++index)
+        text += cut("001", "A001", "10:00:00:00 10:00:00:12", "01:00:00:00 01:00:00:12");
+    const std::string file = folder.write("long.edl", text);
+
+    const Outcome outcome = runCadrelInterrupted({"list", file, "--json", document}, folder);
+
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.json", "long.edl"}));
+    if (outcome.status == 0)
+        EXPECT_EQ(json::parse(contentOf(document)).at("events").size(), 50000U);
+    else
+        EXPECT_EQ(contentOf(document), "former document");
+}
+
+TEST(BadOutput, TheFileOfASplitListThatCantBeWrittenIsNamed)
+{
+    const TempFolder folder;
+    std::string text;
+    for (int index = 0; index < 1000; ++index) {
+        const std::string second = std::to_string(10 + index % 50);
+        const std::string minute = std::to_string(10 + index / 50);
+        const std::string in = minute + ":" + second + ":00";
+        const std::string out = minute + ":" + second + ":12";
+        text += cut("001", std::string("R") + std::to_string(index), std::string("10:") + in + " 10:" + out,
+                    std::string("01:") + in + " 01:" + out);
+    }
+    const std::string file = folder.write("cut.edl", text);
+    std::filesystem::create_directory(folder / "change_2.edl");
+
+    const Outcome outcome =
+        runCadrel({"generate", "--old", file, "--new", file, "-o", folder / "change.edl", "--heal", "none"});
+
+    expectStopped(outcome, (folder / "change_2.edl").string() + ": is a folder; give the name of a file in it");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"change_2.edl", "cut.edl"}));
+}
+
+TEST(BadOutput, AnEmptyNameIsASlip)
+{
+    const TempFolder folder;
+    const std::string file = folder.write("cut.edl", oldCut());
+
+    EXPECT_EQ(runCadrel({"generate", "--old", file, "--new", file, "-o", ""}).status, 2);
+    EXPECT_EQ(runCadrel({"generate", "--old", file, "--new", file, "--json", ""}).status, 2);
+    EXPECT_EQ(runCadrel({"list", file, "--json", ""}).status, 2);
 }
 
 TEST(BadOutput, AFormerFileStaysWhenTheRunFails)

@@ -105,6 +105,25 @@ TEST(Generate, PrintsASummary)
                                (film.folder / "change.edl").string() + "\n");
 }
 
+TEST(Generate, AnInsertThatIsHealedOverStaysAnInsert)
+{
+    const TempFolder folder;
+    const auto reel = [](const std::string& insertedRoll) {
+        return cut("001", "A001", "10:00:00:12 10:00:05:12", "01:00:00:00 01:00:05:00") +
+               cut("002", insertedRoll, "11:00:00:00 11:00:02:00", "01:00:05:00 01:00:07:00") +
+               cut("003", "A003", "12:00:00:00 12:00:03:00", "01:00:07:00 01:00:10:00");
+    };
+    const std::string oldFile = folder.write("old.edl", reel("TAKE3"));
+    const std::string newFile = folder.write("new.edl", reel("TAKE4"));
+
+    const Outcome outcome =
+        runCadrel({"generate", "--old", oldFile, "--new", newFile, "--heal", "inserts", "--rate", "24 fps"});
+
+    EXPECT_NE(outcome.out.find("Change EDL  1 event, 1 of them healed from 2\n"), std::string::npos) << outcome.out;
+    EXPECT_NE(outcome.out.find("Covered     00:00:08:00 of 00:00:10:00, 80.0 %\n"), std::string::npos) << outcome.out;
+    EXPECT_NE(outcome.out.find("01:00:05:00  01:00:07:00  00:00:02:00  TAKE4\n"), std::string::npos) << outcome.out;
+}
+
 TEST(Generate, WithoutAFileThereIsOnlyTheSummary)
 {
     const Film film(oldCut(), newCut());

@@ -1,10 +1,12 @@
 #include "tests/app/ProgramRun.h"
 
+#include <algorithm>
 #include <array>
+#include <csignal>
 #include <cstdlib>
 #include <fcntl.h>
 #include <fstream>
-#include <iterator>
+#include <sched.h>
 #include <spawn.h>
 #include <stdexcept>
 #include <sys/wait.h>
@@ -112,6 +114,29 @@ Outcome runCadrelUnprivileged(const std::vector<std::string>& arguments)
     std::vector<std::string> words{"setpriv", "--reuid=" + id, "--regid=" + id, "--clear-groups", program};
     words.insert(words.end(), arguments.begin(), arguments.end());
     return run(words, {});
+}
+
+Outcome runCadrelInterrupted(const std::vector<std::string>& arguments, const TempFolder& folder)
+{
+    const auto isWriting = [&folder] {
+        const std::vector<std::string> names = folder.names();
+        return std::any_of(names.begin(), names.end(),
+                           [](const std::string& name) { return name.starts_with(".cadrel-"); });
+    };
+    Outputs outputs;
+    outputs.open(STDOUT_FILENO, "/dev/null");
+    outputs.open(STDERR_FILENO, "/dev/null");
+
+    const pid_t child = start(commandLine(CADREL_PROGRAM, arguments), outputs, environ);
+    const auto hasEnded = [child] {
+        siginfo_t state{};
+        return waitid(P_PID, static_cast<id_t>(child), &state, WEXITED | WNOHANG | WNOWAIT) == 0 && state.si_pid != 0;
+    };
+    while (!hasEnded() && !isWriting())
+        sched_yield();
+    kill(child, SIGINT);
+
+    return {exitStatusOf(child), {}, {}};
 }
 
 void giveToUnprivileged(const std::filesystem::path& path)

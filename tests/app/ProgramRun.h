@@ -20,6 +20,9 @@ Outcome runCadrel(const std::vector<std::string>& arguments, const std::string& 
 
 /// Runs `cadrel` as a user without root's rights: as "nobody" where the tests themselves run as root.
 Outcome runCadrelUnprivileged(const std::vector<std::string>& arguments);
+/// Runs `cadrel` and interrupts it, as Ctrl-C does, once it has begun to write a file beside others in `folder`, if it
+/// doesn't end before.
+Outcome runCadrelInterrupted(const std::vector<std::string>& arguments, const TempFolder& folder);
 /// Makes that user the owner of a file or folder.
 void giveToUnprivileged(const std::filesystem::path& path);
 

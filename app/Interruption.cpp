@@ -1,0 +1,51 @@
+#include "app/Interruption.h"
+
+namespace cadrel::app {
+
+namespace {
+
+volatile std::sig_atomic_t requested = 0;
+
+extern "C" void rememberRequest(int signal)
+{
+    requested = signal;
+}
+
+void waitFor(int signal, struct sigaction& former)
+{
+    // A system call that waits, such as for the reader of a pipe, breaks off.
+    struct sigaction action {};
+    action.sa_handler = rememberRequest;
+    sigemptyset(&action.sa_mask);
+    sigaction(signal, &action, &former);
+    // What was started with the signal ignored, as nohup does, keeps ignoring it.
+    if (former.sa_handler == SIG_IGN)
+        sigaction(signal, &former, nullptr);
+}
+
+} // namespace
+
+Interruption::Interruption()
+{
+    requested = 0;
+    waitFor(SIGINT, formerInterrupt_);
+    waitFor(SIGTERM, formerTerminate_);
+    waitFor(SIGHUP, formerHangUp_);
+}
+
+Interruption::~Interruption()
+{
+    sigaction(SIGINT, &formerInterrupt_, nullptr);
+    sigaction(SIGTERM, &formerTerminate_, nullptr);
+    sigaction(SIGHUP, &formerHangUp_, nullptr);
+    if (requested != 0)
+        std::raise(requested);
+}
+
+void Interruption::check()
+{
+    if (requested != 0)
+        throw Requested{};
+}
+
+} // namespace cadrel::app
