@@ -20,6 +20,10 @@ public:
     double& srcOut() { return srcOut_; }
     double& dstIn() { return dstIn_; }
     double& dstOut() { return dstOut_; }
+    double srcIn() const { return srcIn_; }
+    double srcOut() const { return srcOut_; }
+    double dstIn() const { return dstIn_; }
+    double dstOut() const { return dstOut_; }
     void setSrcIn(double seconds) { srcIn_ = seconds; }
     void setSrcOut(double seconds) { srcOut_ = seconds; }
     void setDstIn(double seconds) { dstIn_ = seconds; }

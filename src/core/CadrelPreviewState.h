@@ -1,0 +1,15 @@
+#pragma once
+
+#include "core/Framerate.h"
+
+namespace cadrel::core {
+
+class Settings;
+
+/// What the algorithms that trim cuts know of the project.
+struct CadrelPreviewState {
+    Framerate framerate;
+    const Settings* settings = nullptr; ///< not owned
+};
+
+} // namespace cadrel::core
