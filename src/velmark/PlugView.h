@@ -1,0 +1,58 @@
+#pragma once
+
+#include "velmark/FUnknown.h"
+
+#include <cstddef>
+
+namespace Velmark {
+
+class IPlugView;
+
+/// A rectangle in pixels; right and bottom lie outside.
+struct ViewRect {
+    int32 left = 0;
+    int32 top = 0;
+    int32 right = 0;
+    int32 bottom = 0;
+};
+
+static_assert(sizeof(ViewRect) == 16);
+static_assert(offsetof(ViewRect, left) == 0 && offsetof(ViewRect, top) == 4);
+static_assert(offsetof(ViewRect, right) == 8 && offsetof(ViewRect, bottom) == 12);
+
+/// The host's side of a view. It has no identifier.
+class IPlugFrame : public FUnknown {
+public:
+    /// The view wishes that size; when the host grants it, it calls the view's onSize.
+    virtual int32 resizeView(IPlugView* view, const ViewRect& rect) = 0;
+};
+
+/// What the module puts into a window of the host. The host calls it, on the main thread. An input operation answers
+/// ResultFalse when the view has dealt with it and the host is to do nothing more.
+class IPlugView : public FUnknown {
+public:
+    static constexpr InterfaceId<IPlugView> iid{"5bc32507d06049eaa6151b522b755b29"};
+
+    /// The view becomes visible in a native parent of the kind `type`.
+    virtual int32 attached(void* parent, const char* type) = 0;
+    /// It isn't any more.
+    virtual int32 removed() = 0;
+    virtual int32 idle() = 0;
+    virtual int32 onWheel(float distance) = 0;
+    /// The character, the number of a key without one, and the modifier keys held.
+    virtual int32 onKeyDown(char16_t key, int32 virtualKey, int32 modifiers) = 0;
+    virtual int32 onKeyUp(char16_t key, int32 virtualKey, int32 modifiers) = 0;
+    virtual int32 getSize(ViewRect& rect) = 0;
+    virtual int32 onSize(const ViewRect& rect) = 0;
+    virtual int32 onFocus(bool state) = 0;
+    /// The view keeps a reference; null takes the frame away.
+    virtual int32 setFrame(IPlugFrame* frame) = 0;
+    /// 1 when the user may change the size.
+    virtual int32 canResize() = 0;
+    /// Changes a size that the view can't have into one that it can.
+    virtual int32 checkSizeConstraint(ViewRect& rect) = 0;
+    /// 0 for a kind of native parent that the view can be attached to.
+    virtual int32 isPlatformTypeSupported(const char* type) = 0;
+};
+
+} // namespace Velmark
