@@ -2,9 +2,12 @@
 
 #include "util/Result.h"
 
+#include <cerrno>
+#include <fcntl.h>
 #include <random>
-#include <string>
 #include <system_error>
+#include <unistd.h>
+#include <utility>
 
 namespace cadrel::util {
 
@@ -14,6 +17,9 @@ namespace {
 
 /// As many as the system itself follows.
 constexpr int MostLinks = 40;
+/// From so many bytes on they are handed to the system.
+constexpr std::size_t WellFilled = 1 << 16;
+constexpr mode_t ReadableAndWritable = 0666; // less what the user's mask takes away
 
 /// The file behind a symbolic link, which need not exist.
 fs::path followLinks(fs::path path)
@@ -46,7 +52,34 @@ fs::path unusedNameBeside(const fs::path& target)
 
 bool isWritable(const fs::path& file)
 {
-    return std::ofstream(file, std::ios::binary | std::ios::in).is_open();
+    const int descriptor = ::open(file.c_str(), O_WRONLY | O_CLOEXEC);
+    if (descriptor < 0)
+        return false;
+    ::close(descriptor);
+    return true;
+}
+
+/// Waits until a file or folder is on the disk as it is now. Some disks don't know how, and have nothing to wait for.
+bool waitForDisk(int descriptor)
+{
+    int result = 0;
+    do
+        result = ::fsync(descriptor);
+    while (result != 0 && errno == EINTR);
+    return result == 0 || errno == EINVAL || errno == ENOTSUP || errno == ENOSYS;
+}
+
+/// The same for the names in a folder. A folder that can't be read is left to itself.
+void syncFolderOf(const fs::path& file)
+{
+    const fs::path folder = file.has_parent_path() ? file.parent_path() : fs::path(".");
+    const int descriptor = ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    if (descriptor < 0)
+        return;
+    const bool isOnDisk = waitForDisk(descriptor);
+    ::close(descriptor);
+    if (!isOnDisk)
+        throw Result::FileAccessFailed;
 }
 
 } // namespace
@@ -61,15 +94,16 @@ FileReplacement::FileReplacement(const fs::path& target)
             throw Result::FileAccessFailed;
         openBeside();
     } else {
-        stream_.open(target, std::ios::binary);
+        descriptor_ = ::open(target.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, ReadableAndWritable);
     }
-    if (!stream_.is_open())
+    if (descriptor_ < 0)
         throw Result::FileAccessFailed;
 }
 
 FileReplacement::~FileReplacement()
 {
-    stream_.close();
+    if (descriptor_ >= 0)
+        ::close(descriptor_);
     std::error_code error;
     if (!unfinished_.empty())
         fs::remove(unfinished_, error);
@@ -82,8 +116,8 @@ FileReplacement::~FileReplacement()
 void FileReplacement::openBeside()
 {
     unfinished_ = unusedNameBeside(target_);
-    stream_.open(unfinished_, std::ios::binary);
-    if (!stream_.is_open()) {
+    descriptor_ = ::open(unfinished_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, ReadableAndWritable);
+    if (descriptor_ < 0) {
         unfinished_.clear();
         return;
     }
@@ -95,15 +129,40 @@ void FileReplacement::openBeside()
 
 void FileReplacement::write(std::string_view text)
 {
-    if (!stream_.write(text.data(), static_cast<std::streamsize>(text.size())))
+    if (pending_.size() + text.size() < WellFilled) {
+        pending_ += text;
+    } else {
+        send(std::exchange(pending_, {}));
+        send(text);
+    }
+    if (hasFailed_ || descriptor_ < 0)
         throw Result::FileAccessFailed;
+}
+
+void FileReplacement::send(std::string_view text)
+{
+    while (!text.empty() && !hasFailed_) {
+        const ssize_t written = ::write(descriptor_, text.data(), text.size());
+        if (written >= 0)
+            text.remove_prefix(static_cast<std::size_t>(written));
+        else
+            hasFailed_ = errno != EINTR;
+    }
+}
+
+bool FileReplacement::close()
+{
+    send(std::exchange(pending_, {}));
+    if (!target_.empty() && !hasFailed_)
+        hasFailed_ = !waitForDisk(descriptor_);
+    if (::close(std::exchange(descriptor_, -1)) != 0)
+        hasFailed_ = true;
+    return !hasFailed_;
 }
 
 void FileReplacement::finish()
 {
-    if (stream_.is_open())
-        stream_.close();
-    if (!stream_)
+    if (descriptor_ >= 0 ? !close() : hasFailed_)
         throw Result::FileAccessFailed;
 }
 
@@ -125,6 +184,7 @@ void FileReplacement::putInPlace()
     }
     moveToTarget();
     isPlaced_ = true;
+    syncFolderOf(target_);
 }
 
 void FileReplacement::keep()
@@ -139,8 +199,10 @@ void FileReplacement::keep()
 void FileReplacement::commit()
 {
     finish();
-    if (!target_.empty())
-        moveToTarget();
+    if (target_.empty())
+        return;
+    moveToTarget();
+    syncFolderOf(target_);
 }
 
 void FileReplacement::moveToTarget()

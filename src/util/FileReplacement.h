@@ -1,7 +1,7 @@
 #pragma once
 
 #include <filesystem>
-#include <fstream>
+#include <string>
 #include <string_view>
 
 namespace cadrel::util {
@@ -14,6 +14,10 @@ namespace cadrel::util {
 ///
 /// A target that is a symbolic link stays one: the file behind it is replaced. A target that exists and is no regular
 /// file, such as a device or a pipe, is written directly and never removed.
+///
+/// The content reaches the disk before the name does, so that after a crash or a power failure, too, there is all of the
+/// former file or all of the new one. What a crash may leave beside them is never taken for anything by a later
+/// replacement.
 ///
 /// Several files that belong together are put in place one after the other and kept when all are there; up to `keep`,
 /// destruction takes back what has been done.
@@ -28,7 +32,7 @@ public:
 
     /// Appends to the file. Throws Result::FileAccessFailed when it can't be written; a full disk may show only later.
     void write(std::string_view text);
-    /// Ends the writing. Throws Result::FileAccessFailed when not all could be written.
+    /// Ends the writing; then the content is on the disk. Throws Result::FileAccessFailed when not all could be written.
     void finish();
     /// Moves the former file aside and the finished one to its place. Throws Result::FileAccessFailed.
     void putInPlace();
@@ -36,18 +40,23 @@ public:
     void keep();
 
     /// Finishes the file and replaces the former one at one stroke, so that the target exists at every moment.
-    /// Throws Result::FileAccessFailed.
+    /// Throws Result::FileAccessFailed. Only when the disk fails in the very last step is the new file there even so.
     void commit();
 
 private:
     void openBeside();
+    void send(std::string_view text);
+    /// Closes the file. Whether all that was written has arrived.
+    bool close();
     void moveToTarget();
 
     std::filesystem::path target_;     ///< with symbolic links followed; empty when the target is written directly
     std::filesystem::path unfinished_; ///< empty when there is none (any more)
     std::filesystem::path former_;     ///< the former file while it stands aside, else empty
     bool isPlaced_ = false;            ///< in the place of the target, but not kept yet
-    std::ofstream stream_;
+    int descriptor_ = -1;              ///< of the file that is written; -1 when none is open
+    bool hasFailed_ = false;           ///< something of the content is lost
+    std::string pending_;              ///< content that is handed to the system with what follows
 };
 
 } // namespace cadrel::util

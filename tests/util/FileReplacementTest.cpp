@@ -1,17 +1,24 @@
 #include "util/FileReplacement.h"
 
 #include "tests/core/ThrownResult.h"
+#include "tests/util/ChildProcess.h"
 #include "tests/util/FileSizeLimit.h"
+#include "tests/util/NoPrivileges.h"
 #include "tests/util/TempFolder.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>
 
 #include <array>
+#include <cerrno>
+#include <cstring>
 #include <fcntl.h>
 #include <filesystem>
+#include <optional>
+#include <set>
 #include <string>
 #include <sys/stat.h>
+#include <sys/syscall.h>
 #include <unistd.h>
 #include <vector>
 
@@ -36,24 +43,6 @@ Result::Type resultOfReplacing(const fs::path& target)
 {
     return thrownBy([&] { replace(target, "new"); });
 }
-
-/// While it lives, the process has no more rights than a user who owns none of its files.
-class NoPrivileges {
-public:
-    NoPrivileges() : former_(geteuid())
-    {
-        constexpr uid_t Nobody = 65534;
-        if (former_ == 0) {
-            EXPECT_EQ(seteuid(Nobody), 0);
-        }
-    }
-    NoPrivileges(const NoPrivileges&) = delete;
-    NoPrivileges& operator=(const NoPrivileges&) = delete;
-    ~NoPrivileges() { EXPECT_EQ(seteuid(former_), 0); }
-
-private:
-    uid_t former_;
-};
 
 TEST(FileReplacement, MakesANewFile)
 {
@@ -353,6 +342,153 @@ TEST(FileReplacement, PutsAFileInPlaceOnlyWhenAllOfItIsWritten)
 
     EXPECT_EQ(result, Result::FileAccessFailed);
     EXPECT_EQ(contentOf(path), "former");
+}
+
+TEST(FileReplacement, IsWholeBeforeOrBehindWhereverItIsKilled)
+{
+    const std::string text(200000, 'n');
+    std::set<std::string> found;
+    std::optional<int> status;
+    int step = 0;
+
+    while (!status) {
+        const TempFolder folder;
+        const fs::path path = folder.write("a.txt", "former");
+        status = ChildProcess::statusUnlessKilledAt(++step, [&] { return thrownBy([&] { replace(path, text); }); });
+        const std::string content = contentOf(path);
+        EXPECT_TRUE(content == "former" || content == text) << "killed at step " << step;
+        // What is new stays new.
+        EXPECT_TRUE(content == text || !found.contains(text)) << "killed at step " << step;
+        found.insert(content);
+
+        replace(path, "later");
+        EXPECT_EQ(contentOf(path), "later");
+        for (const std::string& name : folder.names())
+            EXPECT_TRUE(name == "a.txt" || name.starts_with(".cadrel-")) << name;
+    }
+
+    EXPECT_EQ(status, Result::Ok);
+    EXPECT_EQ(found, (std::set<std::string>{"former", text}));
+}
+
+TEST(FileReplacement, LeavesTheFormerFileWhenTheSystemRefusesACall)
+{
+    std::vector<long> renaming{SYS_renameat, SYS_renameat2};
+#ifdef SYS_rename
+    renaming.push_back(SYS_rename); // newer kinds of machine have it no more
+#endif
+    struct {
+        std::vector<long> calls;
+        int error;
+    } const faults[] = {
+        {{SYS_openat}, EMFILE}, {{SYS_write}, ENOSPC}, {{SYS_fsync}, EIO}, {{SYS_close}, EDQUOT}, {renaming, EACCES},
+    };
+    for (const auto& fault : faults) {
+        const TempFolder folder;
+        const fs::path path = folder.write("a.txt", "former");
+
+        const int status = ChildProcess::statusOf([&] {
+            refuseCalls(fault.calls, fault.error);
+            return resultOfReplacing(path);
+        });
+
+        EXPECT_EQ(status, Result::FileAccessFailed) << std::strerror(fault.error);
+        EXPECT_EQ(contentOf(path), "former") << std::strerror(fault.error);
+        EXPECT_EQ(folder.names(), Names{"a.txt"}) << std::strerror(fault.error);
+    }
+}
+
+TEST(FileReplacement, ReportsThatTheNameMayBeLostAgain)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+
+    const int status = ChildProcess::statusOf([&] {
+        FileReplacement file(path);
+        file.write("new");
+        file.finish();
+        refuseCalls({SYS_fsync}, EIO);
+        return thrownBy([&] { file.commit(); });
+    });
+
+    EXPECT_EQ(status, Result::FileAccessFailed);
+    EXPECT_EQ(contentOf(path), "new");
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, TakesAFileBackWhoseNameMayBeLostAgain)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+
+    const int status = ChildProcess::statusOf([&] {
+        return thrownBy([&] {
+            FileReplacement file(path);
+            file.write("new");
+            file.finish();
+            refuseCalls({SYS_fsync}, EIO);
+            file.putInPlace();
+        });
+    });
+
+    EXPECT_EQ(status, Result::FileAccessFailed);
+    EXPECT_EQ(contentOf(path), "former");
+    EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+TEST(FileReplacement, GoesOnWhereADiskKnowsNoWaiting)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+
+    const int status = ChildProcess::statusOf([&] {
+        refuseCalls({SYS_fsync}, EINVAL);
+        return resultOfReplacing(path);
+    });
+
+    EXPECT_EQ(status, Result::Ok);
+    EXPECT_EQ(contentOf(path), "new");
+}
+
+TEST(FileReplacement, IsOnTheDiskWhenItIsFinished)
+{
+    const TempFolder folder;
+
+    const int status = ChildProcess::statusOf([&] {
+        FileReplacement file(folder / "a.txt");
+        file.write("new");
+        refuseCalls({SYS_fsync}, EIO);
+        return thrownBy([&] { file.finish(); });
+    });
+
+    EXPECT_EQ(status, Result::FileAccessFailed);
+}
+
+TEST(FileReplacement, RefusesToBeWrittenOnceItIsFinished)
+{
+    const TempFolder folder;
+    FileReplacement file(folder / "a.txt");
+    file.finish();
+
+    EXPECT_EQ(thrownBy([&] { file.write("more"); }), Result::FileAccessFailed);
+}
+
+TEST(FileReplacement, TakesPiecesOfAnySize)
+{
+    const TempFolder folder;
+    std::string text;
+
+    {
+        FileReplacement file(folder / "a.txt");
+        for (const std::size_t size : {0U, 1U, 65535U, 65536U, 3U, 200000U, 7U}) {
+            const std::string piece(size, static_cast<char>('a' + size % 26));
+            file.write(piece);
+            text += piece;
+        }
+        file.commit();
+    }
+
+    EXPECT_TRUE(contentOf(folder / "a.txt") == text);
 }
 
 } // namespace
