@@ -10,7 +10,7 @@
 PRESET ?= release
 FUZZ_SECONDS ?= 20
 
-sources = $(shell find src app tests bench fuzz -name '*.cpp' -o -name '*.h')
+sources = $(shell find src standin app examples tests bench fuzz -name '*.cpp' -o -name '*.h')
 reel3 = examples/reel3
 
 .PHONY: run test build bench fuzz format check-format clean

@@ -53,18 +53,19 @@ void refuseToOverwrite(const std::vector<std::string>& files, const std::string&
         throw UsageError{output + ": writing it would overwrite another file of this run", "give another name"};
 }
 
-Failure unreadable(const std::string& path)
+Failure unreadable(const std::string& path, FileKind kind)
 {
+    const bool wantsEdl = kind == FileKind::Edl;
     std::error_code error;
     const fs::file_status status = fs::status(path, error);
     switch (status.type()) {
     case fs::file_type::not_found:
         return {path, "no such file", "check the name and the folder"};
     case fs::file_type::directory:
-        return {path, "is a folder", "give the EDL files in it"};
+        return {path, "is a folder", wantsEdl ? "give the EDL files in it" : "give the project file in it"};
     case fs::file_type::character:
     case fs::file_type::block:
-        return {path, "is a device", "give an EDL file"};
+        return {path, "is a device", wantsEdl ? "give an EDL file" : "give a project file"};
     case fs::file_type::fifo:
     case fs::file_type::socket:
         return {path, "is a pipe", "write it into a file first"};

@@ -19,8 +19,11 @@ bool isSameFile(const std::string& a, const std::string& b);
 /// Throws UsageError when writing `output` would overwrite one of the files.
 void refuseToOverwrite(const std::vector<std::string>& files, const std::string& output);
 
+/// What the user is asked for instead of a folder or a device.
+enum class FileKind { Edl, Project };
+
 /// Why a file could not be read, or one of several not written, as far as the file system tells.
-Failure unreadable(const std::string& path);
+Failure unreadable(const std::string& path, FileKind kind = FileKind::Edl);
 Failure unwritable(const std::vector<std::string>& paths);
 
 } // namespace cadrel::app

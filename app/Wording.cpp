@@ -7,6 +7,11 @@ std::string counted(std::size_t count, const std::string& word)
     return std::to_string(count) + " " + word + (count == 1 ? "" : "s");
 }
 
+std::string quoted(const std::string& text)
+{
+    return std::string("\"").append(text).append("\"");
+}
+
 std::string joined(const std::vector<std::string>& texts)
 {
     std::string all;

@@ -8,6 +8,7 @@
 #include "app/ListCommand.h"
 #include "app/PlainStringConverter.h"
 #include "app/ProjectFramerate.h"
+#include "app/ShowCommand.h"
 #include "app/Terminal.h"
 #include "core/Settings.h"
 #include "util/Result.h"
@@ -30,6 +31,7 @@ using app::Failure;
 using app::GenerateOptions;
 using app::ListOptions;
 using app::LoadOptions;
+using app::ShowOptions;
 using app::Terminal;
 using app::UsageError;
 
@@ -38,6 +40,7 @@ enum ExitStatus : int { Done = 0, WorkStopped = 1, WrongUsage = 2 };
 constexpr const char* MainHelp = R"(Examples:
   cadrel generate --old reel3_v07.edl --new reel3_v12.edl -o reel3_change.edl
   cadrel list reel3_v12.edl
+  cadrel show reel3.stage
 
 Exit status: 0 done, 1 a file or its content stopped the work, 2 wrong usage.)";
 
@@ -64,7 +67,19 @@ Examples:
   cadrel list --summary *.edl
   cadrel list reel3_change.edl --audio --rate "25 fps" --json -)";
 
+constexpr const char* ShowHelp =
+    R"(Shows the facts of the project and the tree of its tracks; then what lies on each track, with its times, its clip
+and how far into the clip it begins, and the points of its automation, of long curves the first and the last; then
+the media pool. Times are those of the project's clock; .25 behind a timecode is a quarter of a frame. With --json -
+only the JSON goes to standard output, with all points and with times in seconds, too.
+
+Examples:
+  cadrel show reel3.stage
+  cadrel show reel3.stage --track "DIA 1"
+  cadrel show reel3.stage --track Music --json -)";
+
 constexpr const char* JsonHelp = "Also write the events as JSON; - is standard output";
+constexpr const char* ShowJsonHelp = "Also write it all as JSON; - is standard output";
 
 /// The words of an option in the order of the numbers that they stand for.
 constexpr std::array<const char*, 2> MatchWords{"roll", "clip"};
@@ -83,10 +98,10 @@ std::int32_t numberOf(const std::string& word, const Words& words)
     return static_cast<std::int32_t>(std::distance(words.begin(), std::find(words.begin(), words.end(), word)));
 }
 
-/// An output without a name is a slip, such as a variable of a script that isn't set.
-std::string isNamed(const std::string& file)
+/// An empty name is a slip, such as a variable of a script that isn't set.
+std::string isNamed(const std::string& name)
 {
-    return file.empty() ? "the file name is empty" : std::string();
+    return name.empty() ? "the name is empty" : std::string();
 }
 
 /// The options that say how EDLs are read.
@@ -103,9 +118,12 @@ void addLoadOptions(CLI::App& command, LoadOptions& load)
 
 /// The command line, once parsed.
 struct CommandLine {
+    enum class Command { Generate, List, Show };
+
     GenerateOptions generate;
     ListOptions list;
-    bool wantsList = false;
+    ShowOptions show;
+    Command command = Command::Generate;
 };
 
 /// Throws UsageError without a command and CLI::ParseError for all else, also for --help and --version.
@@ -154,12 +172,24 @@ CommandLine parse(CLI::App& program, int argc, char** argv)
     addLoadOptions(*list, line.list.load);
     list->footer(ListHelp);
 
+    CLI::App* show = program.add_subcommand("show", "Show what is in a sound project");
+    show->add_option("PROJECT", line.show.projectFile, "The project to show")->type_name("")->required();
+    show->add_option("--track", line.show.trackName,
+                     "Show only the tracks of that name; a folder stands for all that is in it")
+        ->check(isNamed)
+        ->type_name("NAME");
+    show->add_option("--json", line.show.jsonFile, ShowJsonHelp)->check(isNamed)->type_name("FILE");
+    show->footer(ShowHelp);
+
     program.parse(argc, argv);
     if (program.get_subcommands().empty())
-        throw UsageError{"give a command, generate or list"};
+        throw UsageError{"give a command, generate, list or show"};
     line.generate.matchBy = numberOf(match, MatchWords);
     line.generate.healMode = numberOf(heal, HealWords);
-    line.wantsList = list->parsed();
+    if (list->parsed())
+        line.command = CommandLine::Command::List;
+    else if (show->parsed())
+        line.command = CommandLine::Command::Show;
     return line;
 }
 
@@ -168,10 +198,17 @@ void run(int argc, char** argv, Terminal& terminal)
     CLI::App program("Carries a sound project over to a new picture cut.", "cadrel");
     try {
         const CommandLine line = parse(program, argc, argv);
-        if (line.wantsList)
-            app::runList(line.list, terminal);
-        else
+        switch (line.command) {
+        case CommandLine::Command::Generate:
             app::runGenerate(line.generate, terminal);
+            break;
+        case CommandLine::Command::List:
+            app::runList(line.list, terminal);
+            break;
+        case CommandLine::Command::Show:
+            app::runShow(line.show, terminal);
+            break;
+        }
     } catch (const CLI::ParseError& error) {
         if (error.get_exit_code() != 0)
             throw UsageError{error.what()};
@@ -194,11 +231,11 @@ int runToStatus(int argc, char** argv, Terminal& terminal)
     } catch (const app::Interruption::Requested&) {
         terminal.clearProgress();
     } catch (const std::bad_alloc&) {
-        terminal.report(Failure{"memory", "there is not enough of it", "split the EDLs or close other programs"});
+        terminal.report(Failure{"memory", "there is not enough of it", "split the files or close other programs"});
     } catch (const util::Result::Type& result) {
-        terminal.report(Failure{"internal", "failure " + std::to_string(result), "report it with the EDLs"});
+        terminal.report(Failure{"internal", "failure " + std::to_string(result), "report it with the files"});
     } catch (const std::exception& exception) {
-        terminal.report(Failure{"internal", exception.what(), "report it with the EDLs"});
+        terminal.report(Failure{"internal", exception.what(), "report it with the files"});
     }
     return WorkStopped;
 }

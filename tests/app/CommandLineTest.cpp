@@ -32,7 +32,7 @@ TEST(CommandLine, VersionIsPrinted)
 TEST(CommandLine, HelpOfEachCommandHasAnExample)
 {
     for (const std::vector<std::string>& arguments :
-         {std::vector<std::string>{"--help"}, {"generate", "--help"}, {"list", "--help"}}) {
+         {std::vector<std::string>{"--help"}, {"generate", "--help"}, {"list", "--help"}, {"show", "--help"}}) {
         const Outcome outcome = runCadrel(arguments);
 
         EXPECT_EQ(outcome.status, 0);
@@ -43,7 +43,7 @@ TEST(CommandLine, HelpOfEachCommandHasAnExample)
 
 TEST(CommandLine, ACommandIsNeeded)
 {
-    expectWrongUsage({}, "generate or list");
+    expectWrongUsage({}, "generate, list or show");
     expectWrongUsage({"conform"}, "conform");
 }
 

@@ -101,6 +101,11 @@ Outcome runCadrel(const std::vector<std::string>& arguments, const std::string& 
     return run(commandLine(CADREL_PROGRAM, arguments), outPath);
 }
 
+Outcome runProgram(const std::string& program, const std::vector<std::string>& arguments)
+{
+    return run(commandLine(program, arguments), {});
+}
+
 Outcome runCadrelUnprivileged(const std::vector<std::string>& arguments)
 {
     if (!isRoot())

@@ -18,6 +18,9 @@ struct Outcome {
 /// empty, and neither output is a terminal.
 Outcome runCadrel(const std::vector<std::string>& arguments, const std::string& outPath = {});
 
+/// Likewise any program.
+Outcome runProgram(const std::string& program, const std::vector<std::string>& arguments);
+
 /// Runs `cadrel` as a user without root's rights: as "nobody" where the tests themselves run as root.
 Outcome runCadrelUnprivileged(const std::vector<std::string>& arguments);
 /// Runs `cadrel` and interrupts it, as Ctrl-C does, once it has begun to write a file beside others in `folder`, if it

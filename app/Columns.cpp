@@ -1,0 +1,46 @@
+#include "app/Columns.h"
+
+#include <algorithm>
+#include <string_view>
+
+namespace cadrel::app {
+
+namespace {
+
+/// In characters.
+std::size_t widthOf(std::string_view utf8)
+{
+    return static_cast<std::size_t>(std::count_if(
+        utf8.begin(), utf8.end(), [](char byte) { return (static_cast<unsigned char>(byte) & 0xc0U) != 0x80U; }));
+}
+
+} // namespace
+
+Columns::Columns(const Row& titles, const std::vector<std::size_t>& rightAligned)
+    : titles_(titles), columns_(titles.size())
+{
+    for (const std::size_t index : rightAligned)
+        columns_[index].alignsRight = true;
+    measure(titles_);
+}
+
+void Columns::measure(const Row& row)
+{
+    for (std::size_t index = 0; index < columns_.size(); ++index)
+        columns_[index].width = std::max(columns_[index].width, widthOf(row[index]));
+}
+
+std::string Columns::lineOf(const Row& row) const
+{
+    std::string line;
+    for (std::size_t index = 0; index < columns_.size(); ++index) {
+        const std::size_t width = widthOf(row[index]);
+        const std::string fill(std::max(columns_[index].width, width) - width, ' ');
+        line += index == 0 ? "" : "  ";
+        line += columns_[index].alignsRight ? fill + row[index] : row[index] + fill;
+    }
+    line.erase(line.find_last_not_of(' ') + 1);
+    return line;
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,39 @@
+#pragma once
+
+#include "core/Framerate.h"
+#include "velmark/Project.h"
+
+#include <string>
+
+namespace cadrel::app {
+
+/// What the clock of a project shows. A project may be longer than a day: the hours count on past 24, and what lies before
+/// midnight has a minus.
+class ProjectClock {
+public:
+    /// `origin` is what the clock shows at time 0, in seconds. Throws Result::NotSupported for a rate that no timecode
+    /// counts at.
+    ProjectClock(const Velmark::FrameRateInfo& rate, double origin);
+
+    /// The label of the rate, and in words what it stands for: "29.97 dfps (drop-frame, pulled down)".
+    std::string rateInWords() const;
+    std::string rateLabel() const;
+
+    /// The timecode of a time of the project to the nearest frame, and for a length.
+    std::string timecode(double seconds) const { return toText(origin_ + seconds); }
+    std::string length(double seconds) const { return toText(seconds); }
+    /// With the hundredths of a frame behind what doesn't lie on one: "03:00:07:12.25".
+    std::string exactTimecode(double seconds) const { return toExactText(origin_ + seconds); }
+    std::string exactLength(double seconds) const { return toExactText(seconds); }
+
+private:
+    std::string toText(double seconds) const;
+    std::string toExactText(double seconds) const;
+    /// Of a count from 0 up.
+    std::string frameText(double frame) const;
+
+    core::Framerate framerate_;
+    double origin_;
+};
+
+} // namespace cadrel::app

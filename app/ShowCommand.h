@@ -1,0 +1,18 @@
+#pragma once
+
+#include <string>
+
+namespace cadrel::app {
+
+class Terminal;
+
+struct ShowOptions {
+    std::string projectFile;
+    std::string trackName; ///< empty: all tracks
+    std::string jsonFile;  ///< empty: none is written; "-": standard output
+};
+
+/// `cadrel show`: what is in a sound project. Throws Failure and UsageError.
+void runShow(const ShowOptions& options, Terminal& terminal);
+
+} // namespace cadrel::app

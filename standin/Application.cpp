@@ -1,0 +1,168 @@
+#include "standin/Application.h"
+
+#include "standin/ProjectManager.h"
+#include "standin/edit/EditService.h"
+#include "standin/file/ProjectFile.h"
+#include "standin/project/Project.h"
+#include "standin/services/ActionManager.h"
+#include "standin/services/AlertService.h"
+#include "standin/services/DependencyManager.h"
+#include "standin/services/FileSelector.h"
+#include "standin/services/HostContext.h"
+#include "standin/services/IdleManager.h"
+#include "standin/services/MenuRegistry.h"
+#include "standin/services/ProgressService.h"
+#include "standin/services/Translations.h"
+#include "standin/services/Transport.h"
+#include "standin/services/WindowFactoryRegistry.h"
+
+#include <utility>
+#include <vector>
+
+using Velmark::Counted;
+using Velmark::makeCounted;
+
+namespace standin {
+
+struct Application::Services {
+    explicit Services(const Terminal& ofUser) : terminal(ofUser) {}
+
+    Terminal terminal;
+    Counted<AlertService> alerts = makeCounted<AlertService>(terminal);
+    Counted<DependencyManager> dependencies = makeCounted<DependencyManager>();
+    Counted<FileSelector> fileSelector = makeCounted<FileSelector>();
+    Counted<IdleManager> idleManager = makeCounted<IdleManager>();
+    Counted<MenuRegistry> menus = makeCounted<MenuRegistry>();
+    Counted<ProgressService> progress = makeCounted<ProgressService>(terminal);
+    Counted<Translations> translations = makeCounted<Translations>();
+    Counted<WindowFactoryRegistry> windowFactories = makeCounted<WindowFactoryRegistry>();
+    Counted<ProjectManager> projects = makeCounted<ProjectManager>(*dependencies);
+    Counted<EditService> edits = makeCounted<EditService>(*projects);
+    Counted<ActionManager> actions = makeCounted<ActionManager>(*projects, *edits);
+    Counted<Transport> transport = makeCounted<Transport>(*projects);
+    Counted<HostContext> context;
+};
+
+Application::Application(const Terminal& terminal) : m_services(std::make_unique<Services>(terminal))
+{
+    m_services->context = makeCounted<HostContext>(*this);
+}
+
+Application::~Application()
+{
+    while (!projects().projects().empty())
+        closeProject(*projects().projects().back());
+}
+
+Velmark::IHostContext* Application::context()
+{
+    return m_services->context.get();
+}
+
+Project& Application::createProject()
+{
+    return projects().add(makeCounted<Project>(edits().log()));
+}
+
+Project& Application::openProject(const std::filesystem::path& file)
+{
+    const auto project = ProjectFile::read(file, edits().log());
+    project->setPath(std::filesystem::absolute(file).u16string());
+    return projects().add(project);
+}
+
+void Application::saveProject(Project& project, const std::filesystem::path& file)
+{
+    project.announceStoring();
+    ProjectFile::write(project, file);
+    std::u16string path = std::filesystem::absolute(file).u16string();
+    if (path == project.path())
+        return;
+    project.setPath(std::move(path));
+    projects().renamed(project);
+}
+
+void Application::activateProject(Project* project)
+{
+    projects().activate(project);
+}
+
+void Application::closeProject(Project& project)
+{
+    if (edits().isOpen())
+        edits().commit(&project, u"");
+    projects().close(project);
+}
+
+void Application::idle()
+{
+    if (!edits().isOpen()) {
+        for (const Counted<Project>& project : std::vector(projects().projects())) {
+            if (project->hasChanges())
+                projects().tellChanges(*project);
+        }
+    }
+    idleManager().callHandlers();
+}
+
+ActionManager& Application::actions()
+{
+    return *m_services->actions;
+}
+
+AlertService& Application::alerts()
+{
+    return *m_services->alerts;
+}
+
+DependencyManager& Application::dependencies()
+{
+    return *m_services->dependencies;
+}
+
+EditService& Application::edits()
+{
+    return *m_services->edits;
+}
+
+FileSelector& Application::fileSelector()
+{
+    return *m_services->fileSelector;
+}
+
+IdleManager& Application::idleManager()
+{
+    return *m_services->idleManager;
+}
+
+MenuRegistry& Application::menus()
+{
+    return *m_services->menus;
+}
+
+ProgressService& Application::progress()
+{
+    return *m_services->progress;
+}
+
+ProjectManager& Application::projects()
+{
+    return *m_services->projects;
+}
+
+Translations& Application::translations()
+{
+    return *m_services->translations;
+}
+
+Transport& Application::transport()
+{
+    return *m_services->transport;
+}
+
+WindowFactoryRegistry& Application::windowFactories()
+{
+    return *m_services->windowFactories;
+}
+
+} // namespace standin

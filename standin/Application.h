@@ -1,0 +1,77 @@
+#pragma once
+
+#include "standin/services/Terminal.h"
+#include "velmark/Context.h"
+#include "velmark/Counted.h"
+
+#include <filesystem>
+#include <memory>
+
+namespace standin {
+
+class ActionManager;
+class AlertService;
+class DependencyManager;
+class EditService;
+class FileSelector;
+class HostContext;
+class IdleManager;
+class MenuRegistry;
+class ProgressService;
+class Project;
+class ProjectManager;
+class Translations;
+class Transport;
+class WindowFactoryRegistry;
+
+/// The stand-in host as a whole: its services, its open projects and its idle call. A module is given `context()` and works
+/// on it as on any host; the program that carries both calls the rest.
+///
+/// It belongs to one thread. What a module has registered has to be taken back before the application goes.
+class Application {
+public:
+    /// `terminal` is where the user is; by default there is none.
+    explicit Application(const Terminal& terminal = Terminal());
+    Application(const Application&) = delete;
+    Application& operator=(const Application&) = delete;
+    /// Closes all projects.
+    ~Application();
+
+    Velmark::IHostContext* context();
+
+    /// A new, empty project, which is told to the listeners.
+    Project& createProject();
+    /// Reads a project file and tells the listeners. Throws ProjectFileError; nothing is opened then.
+    Project& openProject(const std::filesystem::path& file);
+    /// Lets the listeners store what they have, and writes the project. Throws ProjectFileError, with the former file
+    /// untouched.
+    void saveProject(Project& project, const std::filesystem::path& file);
+    /// Null makes none active.
+    void activateProject(Project* project);
+    /// Commits the transaction if one is open.
+    void closeProject(Project& project);
+
+    /// What a host does when the user does nothing: tells of the edits that were made outside of transactions, then calls
+    /// the idle handlers unless they are blocked.
+    void idle();
+
+    ActionManager& actions();
+    AlertService& alerts();
+    DependencyManager& dependencies();
+    EditService& edits();
+    FileSelector& fileSelector();
+    IdleManager& idleManager();
+    MenuRegistry& menus();
+    ProgressService& progress();
+    ProjectManager& projects();
+    Translations& translations();
+    Transport& transport();
+    WindowFactoryRegistry& windowFactories();
+
+private:
+    struct Services;
+
+    std::unique_ptr<Services> m_services;
+};
+
+} // namespace standin

@@ -1,0 +1,169 @@
+#include "standin/edit/RangeEdits.h"
+
+#include "standin/edit/RangeCurves.h"
+#include "standin/project/Event.h"
+#include "standin/project/Project.h"
+
+#include <algorithm>
+#include <optional>
+
+using namespace Velmark;
+
+namespace standin {
+
+namespace {
+
+/// A stretch of an event, in seconds of its track.
+struct Stretch {
+    double start;
+    double end;
+};
+
+/// What an event has in a range; nothing when it reaches less far in than to another instant.
+std::optional<Stretch> stretchIn(const Event& event, double start, double end)
+{
+    if (event.length() < 2.0 * SameInstant) {
+        // Too short to be cut: it is there where it begins.
+        const bool begins = event.start() > start - SameInstant && event.start() <= end - SameInstant;
+        return begins ? std::optional(Stretch{event.start(), event.end()}) : std::nullopt;
+    }
+    const Stretch common{std::max(event.start(), start), std::min(event.end(), end)};
+    return common.end - common.start >= SameInstant ? std::optional(common) : std::nullopt;
+}
+
+/// Those that have something in a range, in order.
+std::vector<Counted<Event>> eventsIn(const Track& track, double start, double end)
+{
+    std::vector<Counted<Event>> events;
+    track.visitTouching(start - SameInstant, end, [&](Node& child) {
+        auto& event = static_cast<Event&>(child);
+        if (stretchIn(event, start, end))
+            events.push_back(Counted<Event>::share(&event));
+    });
+    return events;
+}
+
+bool isEmptyRange(double start, double end)
+{
+    return !(end - start >= SameInstant);
+}
+
+//      from    ..|-- A --|---- B ----|..
+//                   start        end
+//      to      .....|- A-|---- B --|.......
+//               destination
+/// Copies what `from` has in a range to `to`, where nothing is in the way.
+void copyEvents(const Track& from, double start, double end, Track& to, double destination)
+{
+    for (const Counted<Event>& event : eventsIn(from, start, end)) {
+        const Stretch stretch = *stretchIn(*event, start, end);
+        const Counted<Event> piece = event->cutOut(stretch.start, stretch.end);
+        const double offset = std::max(stretch.start - start, 0.0);
+        piece->setSpan(destination + offset, destination + std::max(stretch.end - start, offset));
+        piece->insertInto(to);
+    }
+}
+
+//      before    |---- A ----|   |-- B --|
+//                      start       end
+//      after     |- A -|           |- B -|
+void clearEvents(Track& track, double start, double end)
+{
+    for (const Counted<Event>& event : eventsIn(track, start, end)) {
+        const Stretch stretch = *stretchIn(*event, start, end);
+        if (stretch.start - event->start() >= SameInstant)
+            event->cutOut(event->start(), stretch.start)->takePlaceOf(*event);
+        else
+            event->remove();
+        if (event->end() - stretch.end >= SameInstant)
+            event->cutOut(stretch.end, event->end())->insertInto(track);
+    }
+}
+
+/// Null when no event goes on where this one ends.
+Event* continuationOf(const Event& event)
+{
+    const Container& track = *event.parent();
+    for (Node* child = track.firstChildAfter(event.end() - SameInstant);
+         child && child->start() < event.end() + SameInstant; child = track.childBehind(*child)) {
+        auto* const next = static_cast<Event*>(child);
+        if (next != &event && event.isContinuedBy(*next))
+            return next;
+    }
+    return nullptr;
+}
+
+} // namespace
+
+RangeContent::RangeContent(const std::vector<Track*>& tracks, double start, double end) : m_length(end - start)
+{
+    if (isEmptyRange(start, end))
+        return;
+    for (Track* const track : tracks) {
+        auto content = Track::create(track->kind());
+        copyEvents(*track, start, end, *content, 0.0);
+        for (const auto& [number, curve] : track->curves()) {
+            for (const Counted<AutomationPoint>& point : readCurve(*curve, start, end))
+                point->insertInto(content->curve(number));
+        }
+        m_tracks.push_back({Counted<Track>::share(track), std::move(content)});
+    }
+}
+
+bool RangeContent::isOf(const Project& project) const
+{
+    return std::ranges::all_of(m_tracks, [&](const TrackContent& each) { return each.track->home() == &project; });
+}
+
+void RangeContent::writeAt(double destination) const
+{
+    const double start = std::max(destination, 0.0);
+    const double end = destination + m_length;
+    if (isEmptyRange(start, end))
+        return;
+    const double from = start - destination;
+    for (const auto& [track, content] : m_tracks) {
+        if (!track->project())
+            continue;
+        clearEvents(*track, start, end);
+        copyEvents(*content, from, m_length, *track, start);
+        for (const auto& [number, curve] : track->curves())
+            replaceCurve(*curve, start, end, readCurve(content->curve(number), from, m_length));
+    }
+}
+
+void clearRange(const std::vector<Track*>& tracks, double start, double end)
+{
+    start = std::max(start, 0.0);
+    if (isEmptyRange(start, end))
+        return;
+    for (Track* const track : tracks) {
+        clearEvents(*track, start, end);
+        for (const auto& [number, curve] : track->curves())
+            replaceCurve(*curve, start, end, {});
+    }
+}
+
+bool joinPieces(const std::vector<Track*>& tracks, double start, double end)
+{
+    bool joined = false;
+    for (Track* const track : tracks) {
+        std::vector<Counted<Event>> events;
+        track->visitTouching(start - SameInstant, end + SameInstant, [&](Node& child) {
+            events.push_back(Counted<Event>::share(static_cast<Event*>(&child)));
+        });
+        for (const Counted<Event>& event : events) {
+            // Those to the left may have taken it in.
+            while (event->parent() && event->end() > start - SameInstant && event->end() < end + SameInstant) {
+                Event* const next = continuationOf(*event);
+                if (!next)
+                    break;
+                event->join(*next);
+                joined = true;
+            }
+        }
+    }
+    return joined;
+}
+
+} // namespace standin

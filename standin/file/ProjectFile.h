@@ -1,0 +1,39 @@
+#pragma once
+
+#include "velmark/Counted.h"
+
+#include <filesystem>
+#include <stdexcept>
+#include <string>
+#include <string_view>
+
+namespace standin {
+
+class ChangeLog;
+class Project;
+
+/// What is wrong with a project file. `what()` is one line: the file, the place in it and the fault.
+class ProjectFileError : public std::runtime_error {
+public:
+    using std::runtime_error::runtime_error;
+};
+
+/// The form in which projects are stored: JSON, described in docs/project-file.md. The same project always gives the same
+/// bytes, and a project that was read from them gives them again.
+class ProjectFile {
+public:
+    static constexpr int Version = 1;
+    static constexpr const char* Extension = ".stage";
+
+    /// Throws ProjectFileError. `log` is the host's.
+    static Velmark::Counted<Project> read(const std::filesystem::path& file, ChangeLog& log);
+    /// The same from the content of a file; `name` is for the errors alone.
+    static Velmark::Counted<Project> parse(std::string_view text, const std::string& name, ChangeLog& log);
+    /// Replaces the file at one stroke: whatever happens, there is all of the former or all of the new one. Throws
+    /// ProjectFileError.
+    static void write(const Project& project, const std::filesystem::path& file);
+    /// The content of the file. Throws ProjectFileError, without a name, for a project that no file can hold.
+    static std::string toText(const Project& project);
+};
+
+} // namespace standin

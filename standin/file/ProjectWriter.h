@@ -1,0 +1,68 @@
+#pragma once
+
+#include "standin/file/JsonWriter.h"
+#include "standin/file/ProjectKeys.h"
+#include "standin/project/Attribute.h"
+
+#include <string>
+#include <string_view>
+
+namespace standin {
+
+class AttributeList;
+class AutomationPoint;
+class Container;
+class Envelope;
+class Event;
+class MediaClip;
+class MediaPool;
+class Node;
+class Project;
+class Track;
+
+/// Writes the text of a project file. Whatever it writes can be read again.
+class ProjectWriter {
+public:
+    /// Throws FileFault for what no file can hold, such as a time beyond all bounds; only a program that sets it past the
+    /// interfaces can bring that about.
+    static std::string textOf(const Project& project);
+
+private:
+    explicit ProjectWriter(const Project& project) : m_project(project) {}
+
+    void writeProject();
+    void writeClock();
+    void writePool();
+    void writeClip(const MediaClip& clip);
+    void writeTracks(const Container& parent);
+    void writeTrack(const Track& track);
+    void writeCurves(const Track& track);
+    void writeCurve(const Envelope& curve);
+    void writePoint(const AutomationPoint& point);
+    void writeEvents(const Container& container);
+    void writeEvent(const Event& event);
+    void writeReference(const MediaClip& clip);
+
+    void writeName(const Node& node);
+    /// What any node may have behind what it is: selection, attributes and unknown members.
+    void writeDetails(const Node& node, KnownKeys known, JsonWriter::Layout layout);
+    void writeAttributes(const Node& node, JsonWriter::Layout layout);
+    void writeAttribute(const Attribute& attribute, JsonWriter::Layout layout);
+    void writeUnknownMembers(const Node& node, KnownKeys known);
+
+    void writeSeconds(std::string_view key, double seconds, double least = 0.0);
+    void writeNumber(std::string_view key, double number, double least, double most);
+    void writeCount(std::string_view key, int number);
+    void writeText(std::string_view key, std::string_view text);
+    void writeText(std::string_view key, std::u16string_view text);
+    void writeFlag(std::string_view key, bool flag);
+    void writeKey(std::string_view key);
+    void enter();
+    [[noreturn]] void refuse(const std::string& fault) const;
+
+    const Project& m_project;
+    JsonWriter m_json;
+    int m_depth = 0; ///< of containers in one another
+};
+
+} // namespace standin

@@ -1,0 +1,69 @@
+#include "standin/project/Event.h"
+
+#include "standin/project/Track.h"
+
+#include <cmath>
+#include <string_view>
+#include <typeinfo>
+
+using namespace Velmark;
+
+namespace standin {
+
+namespace {
+
+std::uint64_t nextOrigin()
+{
+    static std::uint64_t last = 0;
+    return ++last;
+}
+
+} // namespace
+
+Event::Event() : m_origin(nextOrigin()) {}
+
+bool Event::isType(const char* word)
+{
+    const Track* const track = this->track();
+    return word && track && std::string_view(word) == Track::wordOf(track->kind());
+}
+
+IEventNode* Event::getOwner()
+{
+    return dynamic_cast<Event*>(parent());
+}
+
+Counted<Event> Event::cutOut(double start, double end) const
+{
+    const double offset = start - this->start();
+    Counted<Event> piece = makePiece(offset, end - start);
+    piece->m_origin = m_origin;
+    piece->m_originOffset = m_originOffset + offset;
+    piece->setSpan(start, end);
+    piece->setName(name());
+    for (const auto& [key, attribute] : attributes())
+        piece->setAttribute(key, attribute);
+    piece->setSelected(selected());
+    piece->setUnknownMembers(unknownMembers());
+    return piece;
+}
+
+bool Event::isContinuedBy(const Event& next) const
+{
+    const auto isSame = [](double a, double b) { return std::abs(a - b) < SameInstant; };
+    return m_origin == next.m_origin && typeid(*this) == typeid(next) && isSame(end(), next.start()) &&
+           isSame(m_originOffset + length(), next.m_originOffset) && name() == next.name() &&
+           attributes() == next.attributes() && sourceRunsOn(next);
+}
+
+void Event::join(Event& next)
+{
+    const double end = next.end();
+    takeContent(next, next.start() - start());
+    next.remove();
+    setSpan(start(), end);
+}
+
+void Event::takeContent(Event& /*next*/, double /*offset*/) {}
+
+} // namespace standin

@@ -1,0 +1,65 @@
+#include "standin/project/MediaClip.h"
+
+#include "standin/project/Project.h"
+
+#include <algorithm>
+#include <cmath>
+#include <limits>
+
+using namespace Velmark;
+
+namespace standin {
+
+namespace {
+
+/// Without folder and extension.
+std::u16string nameOfFile(std::u16string_view path)
+{
+    path.remove_prefix(path.find_last_of(u"/\\") + 1); // npos + 1 is 0
+    const std::size_t dot = path.rfind(u'.');
+    return std::u16string(dot == 0 ? path : path.substr(0, dot));
+}
+
+} // namespace
+
+MediaClip::MediaClip(Kind kind, std::u16string path, double length) : m_kind(kind), m_path(std::move(path))
+{
+    setSpan(0.0, length);
+    Node::setName(nameOfFile(m_path));
+}
+
+bool MediaClip::isType(const char* word)
+{
+    return word && std::string_view(word) == (m_kind == Kind::Audio ? TypeWord::Audio : TypeWord::Video);
+}
+
+uint32 MediaClip::getFrameCount()
+{
+    const Project* const project = this->project();
+    if (!project)
+        return 0;
+    constexpr double Most = std::numeric_limits<uint32>::max();
+    return static_cast<uint32>(std::min(std::round(seconds() * project->frameRate().framesPerSecond), Most));
+}
+
+IFilePath* MediaClip::getFile()
+{
+    // What a caller does to the object mustn't change the clip.
+    if (!m_file || m_file->path() != m_path)
+        m_file = makeCounted<FilePath>(m_path);
+    return m_file.get();
+}
+
+Project* MediaClip::project()
+{
+    return m_pool ? m_pool->project() : nullptr;
+}
+
+void MediaClip::markContentChanged()
+{
+    Node::markContentChanged();
+    if (Project* const project = this->project())
+        project->notePoolChanged();
+}
+
+} // namespace standin

@@ -1,0 +1,46 @@
+#pragma once
+
+#include "standin/project/Node.h"
+#include "standin/services/FilePath.h"
+#include "velmark/Media.h"
+
+namespace standin {
+
+class MediaPool;
+
+/// A file of sound or of picture in the media pool.
+class MediaClip : public Velmark::Implements<MediaClip, Node, Velmark::IMediaClip> {
+public:
+    static constexpr const char* ClassName = "MediaClip";
+
+    enum class Kind { Audio, Video };
+
+    /// `length` in seconds. Its name is the name of the file without folder and extension unless it is given another.
+    MediaClip(Kind kind, std::u16string path, double length);
+
+    bool isType(const char* word) override;
+    Velmark::uint32 getFrameCount() override;
+    Velmark::IFilePath* getFile() override;
+
+    /// That of its pool; null when it is in none.
+    Project* project() override;
+    Kind kind() const { return m_kind; }
+    const std::u16string& path() const { return m_path; }
+    double seconds() const { return length(); }
+    /// The number of the clip in the project file; 0 for one that is in no pool yet.
+    int number() const { return m_number; }
+
+protected:
+    void markContentChanged() override;
+
+private:
+    friend class MediaPool;
+
+    Kind m_kind;
+    std::u16string m_path;
+    Velmark::Counted<FilePath> m_file; ///< what was handed out
+    int m_number = 0;
+    MediaPool* m_pool = nullptr;
+};
+
+} // namespace standin

@@ -1,0 +1,191 @@
+#pragma once
+
+#include "standin/edit/Edit.h"
+#include "standin/project/Attribute.h"
+#include "standin/project/TimeTree.h"
+#include "velmark/Implements.h"
+#include "velmark/ProjectNode.h"
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+
+namespace standin {
+
+class Container;
+class Project;
+class Track;
+
+/// Edges that are closer than this, in seconds, are one instant.
+inline constexpr double SameInstant = 1.0 / 384000;
+
+/// How a project can be found as long as it is there.
+struct ProjectLink : Velmark::Implements<ProjectLink, Velmark::FObject> {
+    static constexpr const char* ClassName = "ProjectLink";
+
+    explicit ProjectLink(Project& linked) : project(&linked) {}
+
+    Project* project; ///< null when it has gone
+};
+
+/// The base of every object of a project. It lies in one container at most, which holds a reference to it; its times are
+/// counted from the start of that container, and from time 0 while it lies in none.
+///
+/// Each change is made through an exchange of an old value for a new one. When the node belongs to a project, the change
+/// goes to the ChangeLog, whose transaction may be open, and the project notes whom to tell of it.
+class Node : public Velmark::Implements<Node, Velmark::FObject, Velmark::IProjectNode>, private TimeSpan {
+public:
+    static constexpr const char* ClassName = "Node";
+
+    Node(const Node&) = delete;
+    Node& operator=(const Node&) = delete;
+    ~Node() override;
+
+    // IProjectNode
+    bool isType(const char* word) override;
+    Velmark::uint32 changeFlags() override { return m_changeFlags; }
+    Velmark::int32 setAttribute(const char* key, const Velmark::FVariant& value, bool persistent) override;
+    Velmark::int32 getAttribute(const char* key, Velmark::FVariant& value) override;
+    Velmark::int32 hasAttribute(const char* key) override;
+    Velmark::int32 removeAttribute(const char* key) override;
+    const char16_t* getName() override { return m_name.c_str(); }
+    Velmark::int32 setName(Velmark::FUnknown* container, Velmark::IString* name, Velmark::int32 reserved) override;
+    bool isSelected() override { return m_isSelected; }
+    double getStart(Velmark::FUnknown* container) override;
+    Velmark::int32 setStart(Velmark::FUnknown* container, Velmark::int32 reserved, double seconds) override;
+    Velmark::int32 setLength(Velmark::FUnknown* container, Velmark::FUnknown* transaction, double seconds) override;
+    double getEnd(Velmark::FUnknown* container) override;
+    Velmark::int32 setEnd(Velmark::FUnknown* container, Velmark::int32 reserved, double seconds) override;
+    double getSourceOffset(Velmark::FUnknown* container) override;
+    Velmark::INodeIterator* newChildIterator() override;
+    Velmark::IProjectNode* getParent() override;
+
+    // Where it stands.
+
+    Container* parent() const { return m_parent; }
+    /// The node itself, or the nearest above it, that is such; null when there is none.
+    virtual Project* project();
+    virtual Track* track();
+    /// The project that it was in; null when it never was in one and when that has gone.
+    const Project* home() const { return m_home ? m_home->project : nullptr; }
+    /// Whether it may be put into the project: a node that has been in one is known to the undo list there, and not fit for
+    /// another.
+    bool canBelongTo(const Project& project) const { return !m_home || home() == &project; }
+    /// Seconds from the start of the parent.
+    double start() const { return TimeSpan::start; }
+    double end() const { return TimeSpan::end; }
+    double length() const { return end() - start(); }
+    /// Seconds from the start of the project.
+    double absoluteStart() const;
+    double absoluteEnd() const;
+    /// `end` must not lie before `start`, and both must be finite.
+    void setSpan(double start, double end);
+    /// Takes the node out of its container, if it is in one, and puts it into another behind all that start with it.
+    /// The container must accept it.
+    void insertInto(Container& parent);
+    /// Takes `former` out of its container, in which it must be, and goes into it instead. Of two that start together it is
+    /// in the same place among all that do.
+    void takePlaceOf(Node& former)
+    {
+        const Place place{former.m_parent, former.order};
+        former.remove();
+        moveTo(place);
+    }
+    void remove();
+
+    // What it is.
+
+    /// Whether it is one of those that can have children, and so a context of times for them.
+    virtual bool holdsChildren() const { return false; }
+    const std::u16string& name() const { return m_name; }
+    void setName(std::u16string name);
+    const Attributes& attributes() const;
+    void setAttribute(const std::string& key, std::optional<Attribute> attribute);
+    bool selected() const { return m_isSelected; }
+    /// Doesn't count as a change.
+    void setSelected(bool selected) { m_isSelected = selected; }
+    /// Members of the project file that this version doesn't know, as the text of a JSON object; empty without any.
+    const std::string& unknownMembers() const;
+    void setUnknownMembers(std::string json);
+
+    // What happened to it, as Velmark::ChangeFlag bits. Marks are collected until the project shows them to those who are
+    // told.
+
+    void mark(Project& project, Velmark::uint32 flags);
+    /// Makes the marks the answer of changeFlags().
+    void showMarks() { m_changeFlags = static_cast<Velmark::uint8>(m_changeFlags | m_marks); }
+    void hideMarks() { m_changeFlags = 0; }
+    void clearMarks() { m_marks = 0; }
+
+protected:
+    /// What of its span can be changed through its interface: nothing, where it stands, or its length too.
+    enum class Extent { Fixed, Instant, Stretch };
+
+    Node() = default;
+
+    virtual Extent extent() const { return Extent::Fixed; }
+    /// Marks what has moved away with this node: itself, and the tracks below it.
+    virtual void markRemoved(Project& project);
+    /// Marks the track and the project of this node.
+    virtual void markContentChanged();
+
+    /// Changes a value by an exchange of `object`, which is this node, and takes it down.
+    template <class Object, class Value>
+    void change(Object& object, Value (Object::*exchange)(Value), Value value)
+    {
+        Value former = (object.*exchange)(std::move(value));
+        if (Project* const recording = recordingProject())
+            record(*recording, std::make_unique<ValueEdit<Object, Value>>(object, exchange, std::move(former)));
+    }
+
+private:
+    friend class Container;
+
+    /// A container and a place in it; none for a node that isn't inserted.
+    struct Place {
+        Container* parent = nullptr;
+        std::uint64_t order = 0;
+    };
+    struct Span {
+        double start;
+        double end;
+    };
+    using KeyedAttribute = std::pair<std::string, std::optional<Attribute>>;
+    /// What few nodes have.
+    struct Extras {
+        Attributes attributes;
+        std::string unknownMembers;
+    };
+
+    Place exchangePlace(Place place);
+    Span exchangeSpan(Span span);
+    std::u16string exchangeName(std::u16string name);
+    KeyedAttribute exchangeAttribute(KeyedAttribute attribute);
+
+    void moveTo(Place place);
+    void leaveParent();
+    /// The project that the node is in, or was in before it was taken out, when that is open and a transaction is; else null.
+    Project* recordingProject();
+    static void record(Project& project, std::unique_ptr<Edit> edit);
+
+    /// The absolute start of the parent; 0 without one.
+    double parentStart() const;
+    /// Seconds from the start of the parent to the start of a context of times; nothing for an object of another project or
+    /// of none.
+    std::optional<double> offsetOf(Velmark::FUnknown* container);
+    /// Sets a span that came in through the interface. Refuses what isn't finite, not after the start of the parent, or
+    /// beyond all time; and a negative length.
+    Velmark::int32 setCheckedSpan(double start, double end);
+    Extras& extras();
+
+    Container* m_parent = nullptr;
+    Velmark::Counted<ProjectLink> m_home; ///< to the project that it was in; null when it never was in one
+    std::u16string m_name;
+    std::unique_ptr<Extras> m_extras;
+    Velmark::uint8 m_marks = 0;
+    Velmark::uint8 m_changeFlags = 0;
+    bool m_isSelected = false;
+};
+
+} // namespace standin

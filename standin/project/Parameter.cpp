@@ -1,0 +1,19 @@
+#include "standin/project/Parameter.h"
+
+#include "standin/project/Project.h"
+
+#include <cmath>
+
+using namespace Velmark;
+
+namespace standin {
+
+int32 Parameter::setValue(int32 /*flags*/, double value)
+{
+    if (!(std::abs(value) <= Project::FurthestTime))
+        return ResultFalse;
+    m_value = value;
+    return ResultOk;
+}
+
+} // namespace standin

@@ -1,0 +1,133 @@
+#pragma once
+
+#include "standin/edit/ChangeLog.h"
+#include "standin/edit/UndoList.h"
+#include "standin/project/Container.h"
+#include "standin/project/MediaPool.h"
+#include "standin/project/Parameter.h"
+#include "standin/services/HandlerList.h"
+#include "velmark/Project.h"
+
+#include <string>
+#include <vector>
+
+namespace standin {
+
+class MarkerTrack;
+class Track;
+
+/// A project: the root of the tracks, the media pool and the clock, and what the user sees of them.
+///
+/// It notes which of its objects have changed, and keeps them alive, until all have been told.
+class Project : public Velmark::Implements<Project, Container, Velmark::IProjectDocument, Velmark::ITimeBase> {
+public:
+    static constexpr const char* ClassName = "Project";
+
+    /// All that is measured in time is limited to this, in seconds: over 30 years.
+    static constexpr double FurthestTime = 1e9;
+    /// How many containers lie in one another at the most, the project included.
+    static constexpr int DeepestNesting = 100;
+
+    /// An empty project of 24 frames per second. The log is the host's and outlives the project.
+    explicit Project(ChangeLog& log);
+    ~Project() override;
+
+    // IProjectDocument
+    Velmark::int32 setProjectEnd(double seconds) override;
+    Velmark::IFilePath* getProjectFile(Velmark::IProjectDocument* project) override;
+    Velmark::IMarkerTrack* getDefaultMarkerTrack() override;
+    Velmark::ILocators* getLocators() override;
+    Velmark::FUnknown* getContainer(Velmark::FUnknown* object) override;
+    Velmark::FUnknown* createTrack(const char* typeWord) override;
+    Velmark::int32 addStorageNotification(Velmark::IProjectStorageNotification* listener) override;
+    Velmark::int32 removeStorageNotification(Velmark::IProjectStorageNotification* listener) override;
+    Velmark::IMediaPool* getMediaPool() override;
+
+    // ITimeBase
+    Velmark::int32 getFrameRate(Velmark::FrameRateInfo& info) override;
+    double getTimeOrigin() override;
+
+    // IProjectNode
+    /// The later of the set end and the end of the last event or marker.
+    double getEnd(Velmark::FUnknown* container) override;
+
+    Project* project() override { return this; }
+    bool accepts(const Node& child) const override;
+
+    /// Where it is stored; empty for a project that never was.
+    const std::u16string& path() const { return m_path; }
+    void setPath(std::u16string path) { m_path = std::move(path); }
+    const Velmark::FrameRateInfo& frameRate() const { return m_frameRate; }
+    void setFrameRate(const Velmark::FrameRateInfo& info);
+    double timeOrigin() const { return m_timeOrigin; }
+    void setTimeOrigin(double seconds);
+    /// What was set, in seconds from the time origin.
+    double setEndTime() const { return m_endTime; }
+
+    MediaPool& pool() const { return *m_pool; }
+    /// Of the project's cycle ("leftTime", "rightTime"), of the transport's, and the position.
+    Parameter& locatorLeft() const { return *m_locatorLeft; }
+    Parameter& locatorRight() const { return *m_locatorRight; }
+    Parameter& cycleLeft() const { return *m_cycleLeft; }
+    Parameter& cycleRight() const { return *m_cycleRight; }
+    Parameter& position() const { return *m_position; }
+
+    /// The track that the interface answers as default: the first marker track that isn't in a folder; null without one.
+    MarkerTrack* defaultMarkerTrack() const;
+    /// All tracks, folders before what they hold, from top to bottom.
+    std::vector<Track*> allTracks() const;
+
+    /// Whether it is open in the host; only then do its changes go to the log.
+    bool isOpen() const { return m_isOpen; }
+    void setOpen(bool isOpen) { m_isOpen = isOpen; }
+    ChangeLog& log() { return m_log; }
+    const Velmark::Counted<ProjectLink>& link() const { return m_link; }
+    UndoList& undoList() { return m_undoList; }
+
+    /// Notes a node whose first mark was just set.
+    void noteMarked(Node& node);
+    void notePoolChanged() { m_hasPoolChanged = true; }
+    /// Whether something has changed that isn't told yet.
+    bool hasChanges() const { return m_isMarked || m_hasPoolChanged; }
+    /// From now on the nodes answer what was marked so far as their change flags.
+    void showChanges();
+    /// Shows them to those who are told of them now. What is marked from here on is to be told another time.
+    void startTelling();
+    /// All have been told: no flag is shown any more, and what was kept alive for the telling alone is dropped.
+    void endTelling();
+    /// Whether the pool is among what is told.
+    bool tellsOfPool() const { return m_tellsOfPool; }
+    /// Nothing of what has happened so far counts as a change.
+    void clearChanges();
+
+    /// Calls the storage listeners, for a save that is about to be made.
+    void announceStoring();
+
+private:
+    double exchangeEndTime(double seconds);
+
+    ChangeLog& m_log;
+    Velmark::Counted<ProjectLink> m_link;
+    UndoList m_undoList;
+    bool m_isOpen = false;
+    std::u16string m_path;
+    Velmark::FrameRateInfo m_frameRate;
+    double m_timeOrigin = 0.0;
+    double m_endTime = 0.0;
+    Velmark::Counted<MediaPool> m_pool;
+    Velmark::Counted<Parameter> m_locatorLeft;
+    Velmark::Counted<Parameter> m_locatorRight;
+    Velmark::Counted<Parameter> m_cycleLeft;
+    Velmark::Counted<Parameter> m_cycleRight;
+    Velmark::Counted<Parameter> m_position;
+    Velmark::Counted<Velmark::ILocators> m_locators;
+    HandlerList<Velmark::IProjectStorageNotification> m_storageListeners;
+    // The project itself is in neither list: it can't keep itself alive.
+    std::vector<Velmark::Counted<Node>> m_marked;
+    std::vector<Velmark::Counted<Node>> m_told;
+    bool m_isMarked = false;
+    bool m_hasPoolChanged = false;
+    bool m_tellsOfPool = false;
+};
+
+} // namespace standin

@@ -1,0 +1,25 @@
+#pragma once
+
+#include "standin/services/Terminal.h"
+#include "velmark/Implements.h"
+#include "velmark/UserInterface.h"
+
+namespace standin {
+
+/// Alerts as messages on the terminal. Nobody is asked: the default button, which is the first that there is, counts as
+/// used, and its label stands behind the message.
+class AlertService : public Velmark::Implements<AlertService, Velmark::FObject, Velmark::IAlertService> {
+public:
+    static constexpr const char* ClassName = "AlertService";
+
+    explicit AlertService(Terminal& terminal) : m_terminal(terminal) {}
+
+    /// 0, no button, for an alert without a message.
+    Velmark::int32 show(const char16_t* message, const char16_t* button1, const char16_t* button2,
+                        const char16_t* button3) override;
+
+private:
+    Terminal& m_terminal;
+};
+
+} // namespace standin

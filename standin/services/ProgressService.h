@@ -1,0 +1,59 @@
+#pragma once
+
+#include "standin/services/Terminal.h"
+#include "velmark/Implements.h"
+#include "velmark/UserInterface.h"
+
+#include <optional>
+#include <string>
+
+namespace standin {
+
+/// The progress of one operation at a time, as a line on the terminal:
+///
+///     Cadrel:  45% (123 of 270) Processing Project - Generate Markers
+///
+/// The user cancels by interrupting the program: whatever the operation tells of its progress asks for that. All but
+/// `begin` is refused while no operation has begun.
+class ProgressService : public Velmark::Implements<ProgressService, Velmark::FObject, Velmark::IProgressService> {
+public:
+    static constexpr const char* ClassName = "ProgressService";
+
+    explicit ProgressService(Terminal& terminal) : m_terminal(terminal) {}
+    ~ProgressService() override;
+
+    /// Refuses a second operation, and every mode but Modal.
+    Velmark::int32 begin(Velmark::int32 mode, const char16_t* title, bool* cancelled) override;
+    Velmark::int32 setStatus(const char16_t* text) override;
+    Velmark::int32 setRange(Velmark::uint64 total) override;
+    /// Beyond the end of the stage is its end, here and for `tick`.
+    Velmark::int32 setPosition(Velmark::uint64 value) override;
+    Velmark::int32 setText(const char16_t* text) override;
+    Velmark::int32 tick(Velmark::uint64 steps) override;
+    Velmark::int32 show() override;
+    Velmark::int32 end() override;
+
+private:
+    struct Operation {
+        Operation(const char16_t* operationTitle, bool* operationCancelled);
+
+        int percentage() const;
+        std::u16string line() const;
+
+        std::u16string title;
+        std::u16string text;
+        std::u16string status;
+        Velmark::uint64 total = 0; ///< 0 before a stage has begun
+        Velmark::uint64 position = 0;
+        bool* cancelled = nullptr;
+        bool isVisible = false;
+    };
+
+    /// Takes the user's cancel over and draws the line anew.
+    void report(bool looksDifferent = true);
+
+    Terminal& m_terminal;
+    std::optional<Operation> m_operation;
+};
+
+} // namespace standin

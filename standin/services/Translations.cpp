@@ -1,0 +1,108 @@
+#include "standin/services/Translations.h"
+
+#include "standin/project/Text.h"
+#include "velmark/String.h"
+
+#include <filesystem>
+#include <pugixml.hpp>
+#include <string_view>
+#include <system_error>
+#include <vector>
+
+namespace standin {
+
+using namespace Velmark;
+
+namespace {
+
+/// Thrown for a table that isn't written as one.
+struct BrokenTable {};
+
+void require(bool condition)
+{
+    if (!condition)
+        throw BrokenTable();
+}
+
+std::u16string toUtf16(const char* text)
+{
+    require(isWellFormed(std::string_view(text)));
+    return ConstString(text).text16();
+}
+
+/// The children of a node, all of which have to be elements of that name.
+std::vector<pugi::xml_node> childrenNamed(std::string_view name, const pugi::xml_node& node)
+{
+    std::vector<pugi::xml_node> children;
+    for (const pugi::xml_node& child : node.children()) {
+        require(child.name() == name);
+        children.push_back(child);
+    }
+    return children;
+}
+
+const char* requiredAttribute(const char* name, const pugi::xml_node& node)
+{
+    const char* const value = node.attribute(name).value();
+    require(*value != '\0');
+    return value;
+}
+
+std::u16string textOf(const pugi::xml_node& node)
+{
+    std::u16string text;
+    for (const pugi::xml_node& piece : node.children()) {
+        require(piece.type() != pugi::node_element);
+        text += toUtf16(piece.value());
+    }
+    return text;
+}
+
+} // namespace
+
+int32 Translations::addTable(BundleHandle bundle, const char* file, const char* /*domain*/)
+{
+    if (!bundle || !file)
+        return ResultFalse;
+    const std::filesystem::path path = std::filesystem::path(static_cast<const char*>(bundle)) / file;
+    std::error_code ignored;
+    pugi::xml_document document;
+    // A folder can be opened too, but has no size that could be read.
+    if (!std::filesystem::is_regular_file(path, ignored) || !document.load_file(path.c_str()))
+        return ResultFalse;
+    try {
+        for (auto& [language, table] : read(document))
+            m_tables[language].merge(table);
+    } catch (const BrokenTable&) {
+        return ResultFalse;
+    }
+    return ResultOk;
+}
+
+Translations::Tables Translations::read(const pugi::xml_document& document)
+{
+    Tables tables;
+    for (const pugi::xml_node& root : childrenNamed("translations", document)) {
+        for (const pugi::xml_node& language : childrenNamed("language", root)) {
+            Table& table = tables[requiredAttribute("name", language)];
+            for (const pugi::xml_node& text : childrenNamed("text", language)) {
+                const std::u16string source = toUtf16(requiredAttribute("source", text));
+                const std::u16string translated = textOf(text);
+                if (!translated.empty())
+                    table.try_emplace(source, translated);
+            }
+        }
+    }
+    return tables;
+}
+
+const char16_t* Translations::translate(const char16_t* text)
+{
+    const auto table = m_tables.find(m_language);
+    if (!text || table == m_tables.end())
+        return text;
+    const auto found = table->second.find(std::u16string_view(text));
+    return found == table->second.end() ? text : found->second.c_str();
+}
+
+} // namespace standin

@@ -1,0 +1,149 @@
+// What large projects cost. A step that is quadratic in clips would take sixteen times as long for four times as many.
+
+#include "tests/standin/TestHost.h"
+
+#include "standin/project/Track.h"
+#include "velmark/Events.h"
+#include "velmark/Tracks.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <ctime>
+#include <functional>
+
+using namespace Velmark;
+
+namespace standin::tests {
+
+namespace {
+
+/// Of the processor, so that other programs don't count.
+double secondsOf(const std::function<void()>& work)
+{
+    const std::clock_t begun = std::clock();
+    work();
+    return static_cast<double>(std::clock() - begun) / CLOCKS_PER_SEC;
+}
+
+/// One track with so many clips of a second, which come in no order, and an envelope with as many points.
+class LargeHost : public TestHost {
+public:
+    explicit LargeHost(int clips) : m_clips(clips), m_end(clips)
+    {
+        tracks->add(track.get(), 0);
+        edit(u"Fill", [&] {
+            for (int index = 0; index < clips; ++index) {
+                const double start = static_cast<double>(index * 7919LL % clips);
+                addClip(track, u"clip", start, start + 1.0);
+                insertPoint(start);
+            }
+        });
+    }
+
+    void editEachClip()
+    {
+        edit(u"Trim", [&] {
+            for (const Node& clip : childrenOf(*track)) {
+                clip->setEnd(nullptr, 0, clip->getEnd(nullptr) - 0.25);
+                clip->setStart(nullptr, 0, clip->getStart(nullptr) + 0.125);
+            }
+        });
+    }
+
+    void removeEachClip()
+    {
+        edit(u"Delete", [&] {
+            for (const Node& clip : childrenOf(*track))
+                transaction()->remove(track.get(), clip.get());
+        });
+    }
+
+    void copyAllClips()
+    {
+        edit(u"Copy", [&] {
+            editService()->copyRange(document(), tracks.get(), 0, 0.0, m_end, 2.0 * m_end);
+            editService()->copyRange(document(), tracks.get(), 0, 0.5, m_end, 0.0);
+            editService()->closeRange(document(), tracks.get(), 0.0, 3.0 * m_end, 0.0);
+        });
+    }
+
+    /// As a conform does it: each clip has a range of its own.
+    void copyClipByClip()
+    {
+        edit(u"Conform", [&] {
+            for (int index = 0; index < m_clips; ++index)
+                editService()->copyRange(document(), tracks.get(), 0, index + 0.25, index + 1.0, 4.0 * m_end + index);
+            transaction()->deleteRange(document(), 0, 4.0 * m_end, 5.0 * m_end);
+        });
+    }
+
+private:
+    void insertPoint(double time)
+    {
+        const auto point = create<IProjectNode>(context(), ClassId::AutomationPoint);
+        point->setStart(nullptr, 0, time);
+        transaction()->insert(curve.get(), point.get());
+    }
+
+    const int m_clips;
+    const double m_end;
+    Node track = addTrack(TypeWord::Audio, u"DX 1");
+    Node curve = curveOf(track, Envelope::Curve::Volume);
+    Counted<IObjectList> tracks = create<IObjectList>(context());
+};
+
+double secondsToEdit(int clips)
+{
+    return secondsOf([=] {
+        LargeHost host(clips);
+        host.editEachClip();
+        host.copyAllClips();
+        host.copyClipByClip();
+        host.removeEachClip();
+        while (host.undo()) {
+        }
+        while (host.redo()) {
+        }
+    });
+}
+
+} // namespace
+
+TEST(LargeProject, NoEditIsQuadraticInClips)
+{
+    secondsToEdit(1000); // so that the memory is there
+
+    const double few = std::max(secondsToEdit(2500), secondsToEdit(2500));
+    const double many = std::min(secondsToEdit(10000), secondsToEdit(10000));
+
+    EXPECT_LT(many, 8.0 * few);
+}
+
+TEST(LargeProject, WhatLiesOutsideOfARangeDoesNotCount)
+{
+    const auto secondsToCopy = [](int clips) {
+        TestHost host;
+        const auto track = host.addTrack(TypeWord::Audio, u"DX 1");
+        const auto list = create<IObjectList>(host.context());
+        list->add(track.get(), 0);
+        host.edit(u"Fill", [&] {
+            for (int index = 0; index < clips; ++index)
+                host.addClip(track, u"clip", index, index + 1.0);
+        });
+        return secondsOf([&] {
+            host.edit(u"Copy", [&] {
+                for (int index = 0; index < 2000; ++index)
+                    host.editService()->copyRange(host.document(), list.get(), 0, 10.5, 12.5, clips / 2.0);
+            });
+        });
+    };
+    secondsToCopy(1000);
+
+    const double few = std::max(secondsToCopy(1000), secondsToCopy(1000));
+    const double many = std::min(secondsToCopy(50000), secondsToCopy(50000));
+
+    EXPECT_LT(many, 8.0 * few);
+}
+
+} // namespace standin::tests
