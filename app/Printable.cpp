@@ -1,5 +1,7 @@
 #include "app/Printable.h"
 
+#include "util/PrintableCharacter.h"
+
 namespace cadrel::app {
 
 namespace {
@@ -38,15 +40,6 @@ Character firstCharacter(std::string_view text)
     return {};
 }
 
-bool isHarmless(char32_t character)
-{
-    const auto within = [character](char32_t first, char32_t last) { return character >= first && character <= last; };
-    const bool controls = within(0x00, 0x1f) || within(0x7f, 0x9f);
-    const bool invisible = within(0x200b, 0x200f) || within(0x2028, 0x202e) || within(0x2060, 0x206f) ||
-                           character == 0xfeff || within(0xe0000, 0xe007f);
-    return !controls && !invisible;
-}
-
 } // namespace
 
 PrintableText toPrintable(std::string_view text, std::size_t mostCharacters)
@@ -61,7 +54,7 @@ PrintableText toPrintable(std::string_view text, std::size_t mostCharacters)
         const Character character = firstCharacter(text);
         const std::size_t bytes = character.bytes == 0 ? 1 : character.bytes;
         lastStart = result.text.size();
-        if (character.bytes != 0 && isHarmless(character.value)) {
+        if (character.bytes != 0 && util::isPrintable(character.value)) {
             result.text += text.substr(0, bytes);
         } else {
             result.text += '?';

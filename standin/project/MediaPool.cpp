@@ -24,6 +24,8 @@ int32 MediaPool::count(const char* type)
 
 IProjectNode* MediaPool::itemAt(int32 index, const char* type)
 {
+    if (index < 0)
+        return nullptr;
     for (const auto& [number, clip] : m_clips) {
         if (clip->isType(type) && index-- == 0)
             return clip.get();

@@ -1,6 +1,7 @@
 #include "standin/services/Terminal.h"
 
 #include "util/HostString.h"
+#include "util/PrintableCharacter.h"
 #include "velmark/String.h"
 
 #include <algorithm>
@@ -11,18 +12,9 @@ namespace standin {
 namespace {
 
 using cadrel::util::HostString;
+using cadrel::util::isPrintable;
 
 constexpr const char* EraseLine = "\r\033[K";
-
-/// Whether a character is seen and does nothing else: it doesn't control the terminal or turn the writing direction.
-bool isHarmless(wchar_t character)
-{
-    const auto within = [character](wchar_t first, wchar_t last) { return character >= first && character <= last; };
-    const bool controls = within(0x00, 0x1f) || within(0x7f, 0x9f);
-    const bool invisible = within(0x200b, 0x200f) || within(0x2028, 0x202e) || within(0x2060, 0x206f) ||
-                           character == 0xfeff || within(0xe0000, 0xe007f);
-    return !controls && !invisible;
-}
 
 std::string toUtf8(const std::wstring& text)
 {
@@ -38,8 +30,8 @@ void Terminal::writeMessage(const std::u16string& text)
     eraseProgress();
     std::wstring shown = HostString(text).wide();
     std::replace_if(
-        shown.begin(), shown.end(), [](wchar_t character) { return character != L'\n' && !isHarmless(character); },
-        L'?');
+        shown.begin(), shown.end(),
+        [](wchar_t character) { return character != L'\n' && !isPrintable(static_cast<char32_t>(character)); }, L'?');
     *m_out << toUtf8(shown) + "\n" << std::flush;
 }
 
@@ -50,7 +42,8 @@ void Terminal::drawProgress(const std::u16string& text)
     std::wstring shown = HostString(text).wide();
     shown.resize(std::min(shown.size(), LineLength));
     std::replace_if(
-        shown.begin(), shown.end(), [](wchar_t character) { return !isHarmless(character); }, L'?');
+        shown.begin(), shown.end(), [](wchar_t character) { return !isPrintable(static_cast<char32_t>(character)); },
+        L'?');
     *m_out << EraseLine + toUtf8(shown) << std::flush;
     m_hasProgress = true;
 }

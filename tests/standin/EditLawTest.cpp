@@ -72,44 +72,58 @@ public:
 private:
     void editOnce()
     {
-        // What was taken out may come in again.
-        std::vector<AnyNode> nodes = m_outside;
+        std::vector<AnyNode> nodes;
         collect(m_project, nodes);
         const AnyNode& node = m_chance.oneOf(nodes);
-        const AnyNode& other = m_chance.oneOf(nodes);
         switch (m_chance.below(12)) {
         case 0:
         case 1:
-            m_transaction->insert(node.get(), newNode().get());
+            insert(nodes, newNode());
             break;
         case 2:
             if (m_transaction->remove(root(), node.get()) == ResultOk)
                 m_outside.push_back(node);
             break;
         case 3:
-            m_transaction->insert(node.get(), other.get());
+            // What was taken out comes in again, perhaps with what was done to it meanwhile.
+            if (!m_outside.empty())
+                insert(nodes, m_chance.oneOf(m_outside));
             break;
         case 4:
-            m_transaction->move(root(), node.get(), other.get());
+            m_transaction->move(root(), containerFor(nodes, *node).get(), node.get());
             break;
         case 5:
-            node->setStart(other.get(), 0, time());
+            if (!m_outside.empty())
+                change(m_chance.oneOf(m_outside));
             break;
         case 6:
-            node->setEnd(other.get(), 0, time());
-            break;
         case 7:
-            node->setLength(nullptr, m_transaction.get(), time());
-            break;
-        case 8:
             describe(*node);
             break;
+        case 8:
         case 9:
             change(node);
             break;
         default:
             editRange();
         }
+    }
+
+    void insert(const std::vector<AnyNode>& nodes, const AnyNode& child)
+    {
+        m_transaction->insert(containerFor(nodes, *child).get(), child.get());
+    }
+
+    /// Mostly one that the child can lie in.
+    AnyNode containerFor(const std::vector<AnyNode>& nodes, IProjectNode& child)
+    {
+        std::vector<AnyNode> fit;
+        for (const AnyNode& node : nodes) {
+            const auto* const container = dynamic_cast<const Container*>(node.get());
+            if (container && container->accepts(dynamic_cast<const Node&>(child)))
+                fit.push_back(node);
+        }
+        return m_chance.oneOf(fit.empty() || m_chance.oneIn(10) ? nodes : fit);
     }
 
     IProjectNode* root() { return &m_project; }
@@ -163,6 +177,23 @@ private:
     }
 
     void change(const AnyNode& node)
+    {
+        switch (m_chance.below(4)) {
+        case 0:
+            node->setStart(node->getParent(), 0, time());
+            break;
+        case 1:
+            node->setEnd(nullptr, 0, time());
+            break;
+        case 2:
+            node->setLength(nullptr, m_transaction.get(), time());
+            break;
+        default:
+            changeByKind(node);
+        }
+    }
+
+    void changeByKind(const AnyNode& node)
     {
         if (const auto point = query<IAutomationPoint>(node))
             point->setValue(static_cast<float>(m_chance.below(5)) / 4.0f);
