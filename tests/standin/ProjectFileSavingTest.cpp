@@ -109,7 +109,6 @@ TEST_F(ProjectFileSaving, LeavesOneWholeFileWhereverItIsKilled)
 
         const std::string left = content();
         EXPECT_TRUE(left == formerText || left == newText) << "killed at step " << step;
-        EXPECT_TRUE(left == newText || !found.contains(newText)) << "killed at step " << step;
         found.insert(left);
     }
 
