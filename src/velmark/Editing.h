@@ -42,7 +42,7 @@ public:
                             double destination) = 0;
     /// Joins pieces that copyRange has split off one event and that stand side by side again, with equal attributes and a
     /// continuous source. Cuts that the user made stay. 0 when something was joined, ResultFalse when there was nothing
-    /// to join, and anything above for a failure. `reserved` is 0.0.
+    /// to join, and 2 or above for a failure. `reserved` is 0.0.
     virtual int32 closeRange(IProjectDocument* project, IObjectList* tracks, double start, double end,
                              double reserved) = 0;
 };
@@ -61,8 +61,10 @@ public:
     virtual int32 commit(IProjectDocument* project, const char16_t* name) = 0;
     /// `parent` is a container or a node. The project holds a reference to the child while it is inserted.
     virtual int32 insert(FUnknown* parent, FUnknown* child) = 0;
-    /// The undo list keeps a removed child alive.
+    /// `parent` is any container around the child, of which the root is always one. The undo list keeps a removed child
+    /// alive.
     virtual int32 remove(FUnknown* parent, FUnknown* child) = 0;
+    /// `parent` as in remove().
     virtual int32 move(FUnknown* parent, FUnknown* newParent, FUnknown* child) = 0;
     /// The content of the range on every track but rulers, as an object that only `paste` understands; counted.
     /// `reserved` is 0.

@@ -14,6 +14,7 @@ class UpdateHandler;
 /// Only the count is safe with several threads; all else is for the main thread. A class derives through `Implements`.
 class FObject : public IDependent {
 public:
+    /// Our own, for queries within the module.
     static constexpr InterfaceId<FObject> iid{"0c39f86388e9607cc24b9efec3ce3d29"};
     static constexpr const char* ClassName = "FObject";
     /// What the count holds from the last release on, so that a mistaken second one is seen.

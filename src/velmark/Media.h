@@ -71,8 +71,8 @@ public:
     virtual int32 read(void* pixels, int32 stride, const int32 rect[4], int32 reserved) = 0;
 };
 
-/// Draws frames of a clip. The only interface that is used from a thread other than the main one; each such thread makes a
-/// factory of its own.
+/// Draws frames of a clip. The only interface that is used from a thread other than the main one, and with it what it reads
+/// of the clip; for each such thread a factory is made, on the main thread.
 class IThumbnailFactory : public FUnknown {
 public:
     static constexpr InterfaceId<IThumbnailFactory> iid{"03ad35cd681a4f14bca22c095b030b36"};

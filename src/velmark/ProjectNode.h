@@ -9,8 +9,8 @@ class INodeIterator;
 class IString;
 
 /// The words of IProjectNode::isType. A node answers to several: a marker track to "track" and "marker", an event to the
-/// kind of its track, a range marker to "range" beside. They name the kind of what `createTrack` makes and of the items
-/// of the media pool, too.
+/// kind of its track, a range marker to "range" and a part to "part" beside. They name the kind of what `createTrack` makes
+/// and of the items of the media pool, too.
 struct TypeWord {
     static constexpr const char* Track = "track";
     static constexpr const char* Audio = "audio";
@@ -38,7 +38,8 @@ struct ChangeFlag {
 /// is time 0. `container` is the time context that IProjectDocument::getContainer gives. Null, the root, a folder, a track
 /// and a curve all mean these times; a part means seconds from its own start.
 ///
-/// Setters work on what isn't inserted, and outside transactions too; inside one they belong to it.
+/// What is not inserted has its times from the start of the project, and keeps them when it is. Setters work there, and
+/// outside transactions too; inside one they belong to it.
 class IProjectNode : public FUnknown {
 public:
     static constexpr InterfaceId<IProjectNode> iid{"7a6f999fbdbc4bccac403dabace8a171"};

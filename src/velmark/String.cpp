@@ -76,7 +76,9 @@ void ConstString::set(std::u16string text)
 int32 ConstString::compare(const ConstString& other) const
 {
     // The bytes of UTF-8 stand in the order of the characters.
-    return std::strcmp(text8(), other.text8());
+    const int32 order = std::strcmp(text8(), other.text8());
+    // Two texts in UTF-16 that can't be converted read the same in UTF-8.
+    return order == 0 && m_is16 && other.m_is16 ? m_text16.compare(other.m_text16) : order;
 }
 
 bool ConstString::readInteger(int64& value) const

@@ -8,7 +8,7 @@ namespace Velmark {
 
 /// A text that doesn't change, in either of two widths: UTF-8 or UTF-16. It keeps a copy of what it was made from and
 /// has the other width ready beside it. A text that can't be converted shows so: its other width reads "<StrErr_2>" when
-/// it was UTF-8, "<StrErr_4>" when it was UTF-16.
+/// it was UTF-8, "<StrErr_4>" when it was UTF-16, and "<StrErr_1>" or "<StrErr_3>" when it was a byte order mark alone.
 class ConstString {
 public:
     ConstString() = default;

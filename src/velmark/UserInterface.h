@@ -74,7 +74,7 @@ public:
 
     /// Waits for the user; the box opens in the folder `path`. The chosen files are added to `chosen` as IFilePath objects.
     /// The number of filters is passed twice, both times the same; without any, every file can be chosen. 0, Cancelled, or
-    /// above for a failure.
+    /// 2 or above for a failure.
     virtual int32 select(const char16_t* title, const FileType* filters, int32 filterCount, int32 sameCount,
                          IFilePath* path, int32 flags, IObjectList* chosen) = 0;
 };
@@ -133,7 +133,8 @@ public:
     virtual int32 removeFactory(IPlugWindowFactory* factory) = 0;
 };
 
-/// A window of the host. It has no identifier.
+/// A window of the host. It has no identifier. While it is open, until windowClosed has been told, the host holds a
+/// reference of its own.
 class IHostWindow : public FUnknown {
 public:
     virtual int32 open() = 0;

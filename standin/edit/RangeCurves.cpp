@@ -82,10 +82,9 @@ bool isNeedless(const AutomationPoint* before, const AutomationPoint& point, con
         const AutomationPoint* const only = before ? before : behind;
         return only && hasValue(only->value());
     }
-    const double span = behind->start() - before->start();
-    // The curve comes to the first of several points at one time and goes on from the last.
-    return span <= 0.0 ||
-           hasValue(std::lerp(before->value(), behind->value(), (point.start() - before->start()) / span));
+    // Points outside of a range stand apart from those at its edges, so these two are never at one time.
+    const double share = (point.start() - before->start()) / (behind->start() - before->start());
+    return hasValue(std::lerp(before->value(), behind->value(), share));
 }
 
 /// Takes a point out of a run of points where the curve is the same without it.

@@ -50,6 +50,19 @@ IFilePath* MediaClip::getFile()
     return m_file.get();
 }
 
+MediaClip::Caption MediaClip::caption() const
+{
+    const std::lock_guard lock(m_captionMutex);
+    return m_caption;
+}
+
+void MediaClip::updateCaption()
+{
+    Caption caption{name(), getFrameCount()};
+    const std::lock_guard lock(m_captionMutex);
+    m_caption = std::move(caption);
+}
+
 Project* MediaClip::project()
 {
     return m_pool ? m_pool->project() : nullptr;
@@ -57,6 +70,7 @@ Project* MediaClip::project()
 
 void MediaClip::markContentChanged()
 {
+    updateCaption();
     Node::markContentChanged();
     if (Project* const project = this->project())
         project->notePoolChanged();

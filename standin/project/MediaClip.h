@@ -4,6 +4,8 @@
 #include "standin/services/FilePath.h"
 #include "velmark/Media.h"
 
+#include <mutex>
+
 namespace standin {
 
 class MediaPool;
@@ -27,6 +29,13 @@ public:
     Kind kind() const { return m_kind; }
     const std::u16string& path() const { return m_path; }
     double seconds() const { return length(); }
+    /// What a picture of it says.
+    struct Caption {
+        std::u16string name;
+        Velmark::uint32 frameCount = 0;
+    };
+    /// As of the last change. For any thread, unlike all else.
+    Caption caption() const;
     /// The number of the clip in the project file; 0 for one that is in no pool yet.
     int number() const { return m_number; }
 
@@ -36,11 +45,15 @@ protected:
 private:
     friend class MediaPool;
 
+    void updateCaption();
+
     Kind m_kind;
     std::u16string m_path;
     Velmark::Counted<FilePath> m_file; ///< what was handed out
     int m_number = 0;
     MediaPool* m_pool = nullptr;
+    mutable std::mutex m_captionMutex;
+    Caption m_caption;
 };
 
 } // namespace standin

@@ -75,4 +75,10 @@ void MediaPool::add(Counted<MediaClip> clip, int number)
     added.markContentChanged();
 }
 
+void MediaPool::frameRateChanged()
+{
+    for (const auto& [number, clip] : m_clips)
+        clip->updateCaption();
+}
+
 } // namespace standin

@@ -27,6 +27,9 @@ public:
     /// Gives the clip the next free number, or the one asked for, which must be free and above 0.
     void add(Velmark::Counted<MediaClip> clip, int number = 0);
 
+    /// The clips last other numbers of frames from now on.
+    void frameRateChanged();
+
     /// Null when the project has gone.
     Project* project() const { return m_project; }
 

@@ -147,6 +147,7 @@ bool Project::accepts(const Node& child) const
 void Project::setFrameRate(const FrameRateInfo& info)
 {
     m_frameRate = info;
+    m_pool->frameRateChanged();
     mark(*this, ChangeFlag::Content);
 }
 

@@ -1,17 +1,29 @@
 #include "standin/services/ObjectFactory.h"
 
+#include "standin/services/ThumbnailFactory.h"
+
+#include <string_view>
+
 namespace standin {
 
 using namespace Velmark;
 
-FUnknown* ObjectFactory::createObject(const char* /*className*/, const char* /*typeName*/)
+FUnknown* ObjectFactory::createObject(const char* className, const char* typeName)
 {
-    return nullptr;
+    if (!className || !typeName || std::string_view(className) != ThumbnailClass ||
+        std::string_view(typeName) != ThumbnailType)
+        return nullptr;
+    FObject* const created = makeCounted<ThumbnailFactory>().detach();
+    m_givenOut.insert(created);
+    return created;
 }
 
-int32 ObjectFactory::releaseObject(FUnknown* /*object*/)
+int32 ObjectFactory::releaseObject(FUnknown* object)
 {
-    return ResultFalse;
+    if (m_givenOut.erase(object) == 0)
+        return ResultFalse;
+    object->release();
+    return ResultOk;
 }
 
 } // namespace standin

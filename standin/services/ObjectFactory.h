@@ -3,15 +3,21 @@
 #include "velmark/Implements.h"
 #include "velmark/Media.h"
 
+#include <set>
+
 namespace standin {
 
-/// This host draws no pictures: there is no class that it could make objects of, and so none to give back.
+/// Makes thumbnail factories, and nothing else.
 class ObjectFactory : public Velmark::Implements<ObjectFactory, Velmark::FObject, Velmark::IObjectFactory> {
 public:
     static constexpr const char* ClassName = "ObjectFactory";
 
     Velmark::FUnknown* createObject(const char* className, const char* typeName) override;
+    /// Refuses what it hasn't made, and what was given back already.
     Velmark::int32 releaseObject(Velmark::FUnknown* object) override;
+
+private:
+    std::set<Velmark::FUnknown*> m_givenOut;
 };
 
 } // namespace standin

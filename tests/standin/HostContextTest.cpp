@@ -164,17 +164,4 @@ TEST(ViewManager, AnswersThatThereAreNoWindows)
     EXPECT_NE(views->openWindow(nullptr, nullptr, nullptr), ResultOk);
 }
 
-TEST(ObjectFactory, AnswersThatThereAreNoThumbnails)
-{
-    Application application;
-    const auto factory = service<IObjectFactory>(application.context());
-    const auto foreign = makeCounted<FObject>();
-
-    EXPECT_EQ(factory->createObject(IObjectFactory::ThumbnailClass, IObjectFactory::ThumbnailType), nullptr);
-    EXPECT_EQ(factory->createObject(nullptr, nullptr), nullptr);
-    EXPECT_NE(factory->releaseObject(foreign.get()), ResultOk);
-    EXPECT_NE(factory->releaseObject(nullptr), ResultOk);
-    EXPECT_EQ(foreign->refCount(), 1) << "What it hasn't made it doesn't release.";
-}
-
 } // namespace standin::tests

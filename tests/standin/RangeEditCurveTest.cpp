@@ -213,12 +213,14 @@ TEST(AutomationInRanges, TheEdgesBetweenNeighbouringCopiesCloseAgainInWhateverOr
     EXPECT_EQ(downward.dump(), whole.dump());
 }
 
-TEST(AutomationInRanges, AttributesTravelWithThePoints)
+TEST(AutomationInRanges, AllThatAPointHasTravelsWithIt)
 {
     Film film;
     const auto point = film.addPoint(film.track, Envelope::Curve::Volume, 5, 0.5f);
     point->setAttribute("by", FVariant::string("mixer"), true);
     point->setName(nullptr, text(u"dip").get(), 0);
+    dynamic_cast<Node&>(*point).setSelected(true);
+    dynamic_cast<Node&>(*point).setUnknownMembers(R"({"shape":"s"})");
 
     film.copyRange({film.track}, 0, 10, 40);
 
@@ -226,6 +228,8 @@ TEST(AutomationInRanges, AttributesTravelWithThePoints)
     ASSERT_EQ(points.size(), 2U);
     EXPECT_EQ(points[1]->getStart(nullptr), 45.0);
     EXPECT_EQ(points[1]->getName(), std::u16string(u"dip"));
+    EXPECT_TRUE(points[1]->isSelected());
+    EXPECT_EQ(dynamic_cast<Node&>(*points[1]).unknownMembers(), R"({"shape":"s"})");
     FVariant value;
     ASSERT_EQ(points[1]->getAttribute("by", value), ResultOk);
     EXPECT_STREQ(value.asString(), "mixer");

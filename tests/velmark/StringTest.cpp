@@ -54,6 +54,18 @@ TEST(String, ShowsThatATextCannotBeConverted)
     const ConstString broken16(halfAPair);
     EXPECT_EQ(std::u16string(broken16.text16()), halfAPair);
     EXPECT_STREQ(broken16.text8(), "<StrErr_4>");
+
+    EXPECT_EQ(std::u16string(ConstString("\xEF\xBB\xBF").text16()), u"<StrErr_1>");
+    EXPECT_STREQ(ConstString(u"\uFEFF").text8(), "<StrErr_3>");
+}
+
+TEST(String, TellsTextsApartThatCannotBeConverted)
+{
+    const char16_t halfAPair[] = {u'a', 0xD83C, 0};
+    const char16_t anotherHalf[] = {u'b', 0xD83C, 0};
+
+    EXPECT_FALSE(ConstString(halfAPair) == ConstString(anotherHalf));
+    EXPECT_TRUE(ConstString(halfAPair) == ConstString(halfAPair));
 }
 
 TEST(String, ComparesByCharactersWhateverTheWidths)
