@@ -1,0 +1,41 @@
+# cadrel_juce: the JUCE modules that the window needs, built once from Debian's juce-modules-source. Its headers are system
+# headers, and its own code has none of our warnings.
+
+find_path(CADREL_JUCE_MODULES juce_core/juce_core.h PATHS /usr/share/juce/modules NO_DEFAULT_PATH REQUIRED
+    DOC "The folder of the JUCE modules")
+find_package(Freetype REQUIRED)
+find_package(JPEG REQUIRED)
+find_package(PNG REQUIRED)
+find_package(Threads REQUIRED)
+find_package(ZLIB REQUIRED)
+
+set(CADREL_JUCE_MODULE_NAMES juce_core juce_events juce_graphics)
+
+# cadrel_juce_library(name [option...]): the modules, compiled with the options alone or, without any, as all else is.
+function(cadrel_juce_library target)
+    set(sources)
+    foreach(module IN LISTS CADREL_JUCE_MODULE_NAMES)
+        list(APPEND sources ${CADREL_JUCE_MODULES}/${module}/${module}.cpp)
+    endforeach()
+    add_library(${target} STATIC ${sources})
+    target_include_directories(${target} SYSTEM PUBLIC ${CADREL_JUCE_MODULES})
+    # What uses the modules has to see the same switches as they did.
+    target_compile_definitions(${target} PUBLIC
+        DONT_SET_USING_JUCE_NAMESPACE=1
+        JUCE_DISABLE_JUCE_VERSION_PRINTING=1
+        JUCE_GLOBAL_MODULE_SETTINGS_INCLUDED=1
+        JUCE_STANDALONE_APPLICATION=0
+        JUCE_USE_CURL=0
+        $<IF:$<CONFIG:Debug>,_DEBUG=1,NDEBUG=1>)
+    foreach(module IN LISTS CADREL_JUCE_MODULE_NAMES)
+        target_compile_definitions(${target} PUBLIC JUCE_MODULE_AVAILABLE_${module}=1)
+    endforeach()
+    target_link_libraries(${target}
+        PRIVATE Freetype::Freetype JPEG::JPEG PNG::PNG ZLIB::ZLIB
+        PUBLIC Threads::Threads ${CMAKE_DL_LIBS})
+    if(ARGN)
+        set_target_properties(${target} PROPERTIES COMPILE_OPTIONS "${ARGN}")
+    endif()
+endfunction()
+
+cadrel_juce_library(cadrel_juce)

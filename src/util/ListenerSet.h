@@ -1,0 +1,30 @@
+#pragma once
+
+#include <set>
+
+namespace cadrel::util {
+
+/// Those who want to be told of something, each once. They aren't owned: a listener removes itself before it dies. They may
+/// be added and removed while they are told; one that is removed before its turn isn't told any more.
+template <class Listener>
+class ListenerSet {
+public:
+    void add(Listener* listener) { listeners_.insert(listener); }
+    void remove(Listener* listener) { listeners_.erase(listener); }
+
+    /// `tell` is called with each listener in turn.
+    template <class Tell>
+    void forEach(Tell&& tell) const
+    {
+        for (auto next = listeners_.begin(); next != listeners_.end();) {
+            Listener* const listener = *next;
+            tell(*listener);
+            next = listeners_.upper_bound(listener);
+        }
+    }
+
+private:
+    std::set<Listener*> listeners_;
+};
+
+} // namespace cadrel::util

@@ -1,0 +1,45 @@
+#pragma once
+
+#include "velmark/Context.h"
+#include "velmark/Implements.h"
+
+#include <utility>
+#include <vector>
+
+namespace cadrel::host::tests {
+
+/// A host's context in which some services and classes are missing, or are others.
+class AlteredContext : public Velmark::Implements<AlteredContext, Velmark::FObject, Velmark::IHostContext> {
+public:
+    static constexpr const char* ClassName = "AlteredContext";
+
+    /// The host is the one behind it, not owned; null for none.
+    explicit AlteredContext(Velmark::IHostContext* host) : m_host(host) {}
+
+    void hide(const Velmark::Identifier& id) { m_altered.push_back({id, nullptr}); }
+    /// What is given instead has to answer to the identifier.
+    void replace(const Velmark::Identifier& id, Velmark::Counted<Velmark::FObject> object)
+    {
+        m_altered.push_back({id, std::move(object)});
+    }
+
+    Velmark::int32 getInterface(const Velmark::Identifier& id, void** out) override
+    {
+        for (const auto& [altered, object] : m_altered) {
+            if (altered == id) {
+                *out = nullptr;
+                return object ? object->queryInterface(id, out) : Velmark::ResultFalse;
+            }
+        }
+        if (m_host)
+            return m_host->getInterface(id, out);
+        *out = nullptr;
+        return Velmark::ResultFalse;
+    }
+
+private:
+    Velmark::IHostContext* m_host;
+    std::vector<std::pair<Velmark::Identifier, Velmark::Counted<Velmark::FObject>>> m_altered;
+};
+
+} // namespace cadrel::host::tests
