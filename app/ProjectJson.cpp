@@ -74,6 +74,7 @@ void ProjectJson::write(const std::string& fileName, const Tracks& tracks) const
     using Flag = Velmark::FrameRateInfo::Flag;
     const ordered_json facts{
         {"file", fileName},
+        {"name", toUtf8(project_.name())},
         {"frameRate",
          {{"label", clock_.rateLabel()},
           {"framesPerSecond", rate.framesPerSecond},

@@ -3,7 +3,9 @@
 #include "standin/ProjectManager.h"
 #include "standin/edit/EditService.h"
 #include "standin/file/ProjectFile.h"
+#include "standin/file/Utf16.h"
 #include "standin/project/Project.h"
+#include "standin/project/Text.h"
 #include "standin/services/ActionManager.h"
 #include "standin/services/AlertService.h"
 #include "standin/services/DependencyManager.h"
@@ -16,6 +18,8 @@
 #include "standin/services/Transport.h"
 #include "standin/services/WindowFactoryRegistry.h"
 
+#include <string>
+#include <system_error>
 #include <utility>
 #include <vector>
 
@@ -23,6 +27,24 @@ using Velmark::Counted;
 using Velmark::makeCounted;
 
 namespace standin {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+/// As the module is told it. Throws ProjectFileError for a name that is no text.
+std::u16string fullPathOf(const fs::path& file)
+{
+    std::error_code error;
+    const std::string path = fs::absolute(file, error).string();
+    if (error)
+        throw ProjectFileError(file.string() + ": " + error.message());
+    if (!isWellFormed(path))
+        throw ProjectFileError(file.string() + ": the name is no UTF-8 text");
+    return toUtf16(path);
+}
+
+} // namespace
 
 struct Application::Services {
     explicit Services(const Terminal& ofUser) : terminal(ofUser) {}
@@ -64,18 +86,18 @@ Project& Application::createProject()
     return projects().add(makeCounted<Project>(edits().log()));
 }
 
-Project& Application::openProject(const std::filesystem::path& file)
+Project& Application::openProject(const fs::path& file)
 {
     const auto project = ProjectFile::read(file, edits().log());
-    project->setPath(std::filesystem::absolute(file).u16string());
+    project->setPath(fullPathOf(file));
     return projects().add(project);
 }
 
-void Application::saveProject(Project& project, const std::filesystem::path& file)
+void Application::saveProject(Project& project, const fs::path& file)
 {
+    std::u16string path = fullPathOf(file);
     project.announceStoring();
     ProjectFile::write(project, file);
-    std::u16string path = std::filesystem::absolute(file).u16string();
     if (path == project.path())
         return;
     project.setPath(std::move(path));
@@ -92,6 +114,7 @@ void Application::closeProject(Project& project)
     if (edits().isOpen())
         edits().commit(&project, u"");
     projects().close(project);
+    edits().endAfterClosing(project);
 }
 
 void Application::idle()

@@ -94,8 +94,8 @@ struct FVariantLayout {
     static_assert(offsetof(FVariant, m_value) == 8 && sizeof(FVariant::m_value) == 8);
 };
 
-/// A list of binary values under keys; its class identifier is its interface's. As the value of a persistent attribute it
-/// is stored with the project.
+/// A list of binary values under keys; its class identifier is its interface's. As the value of an attribute it is copied
+/// when it is set and when it is got; what a persistent attribute holds is stored with the project.
 class IAttributeData : public FUnknown {
 public:
     static constexpr InterfaceId<IAttributeData> iid{"fa1e32f9ca6d46f5a982f956b1191b58"};

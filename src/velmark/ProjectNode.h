@@ -45,7 +45,7 @@ public:
     static constexpr InterfaceId<IProjectNode> iid{"7a6f999fbdbc4bccac403dabace8a171"};
 
     virtual bool isType(const char* word) = 0;
-    /// What has happened to the object since all were told last, as ChangeFlag bits.
+    /// What is being told of the object just now, as ChangeFlag bits; 0 at any other time.
     virtual uint32 changeFlags() = 0;
     /// Replaces the attribute. A persistent one is stored with the project, any other is gone once it closes.
     virtual int32 setAttribute(const char* key, const FVariant& value, bool persistent) = 0;

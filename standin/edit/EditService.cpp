@@ -76,7 +76,7 @@ int32 place(Node& node, Container& container)
     const double containerStart = container.absoluteStart();
     const double start = node.absoluteStart() - containerStart;
     const double end = node.absoluteEnd() - containerStart;
-    if (start <= -SameInstant)
+    if (start <= -SameInstant || node.absoluteEnd() > Project::FurthestTime)
         return EditService::Refused;
     node.insertInto(container);
     node.setSpan(std::max(start, 0.0), std::max(end, 0.0));
@@ -129,6 +129,12 @@ bool EditService::redo(Project& project)
     return revert<&UndoList::redo>(project);
 }
 
+void EditService::endAfterClosing(Project& closed)
+{
+    if (isOpen())
+        addEntries(closed, u"");
+}
+
 template <bool (UndoList::*step)()>
 bool EditService::revert(Project& project)
 {
@@ -151,7 +157,7 @@ int32 EditService::copyRange(IProjectDocument* document, IObjectList* list, int3
     const std::optional<std::vector<Track*>> tracks = tracksOf(list, *project);
     if (!tracks)
         return Refused;
-    RangeContent(*tracks, start, end).writeAt(destination);
+    RangeContent(*project, *tracks, start, end).writeAt(destination);
     return ResultOk;
 }
 
@@ -256,7 +262,8 @@ int32 EditService::copyAll(IProjectDocument* document, FUnknown** clipboard, dou
     const Project* const project = m_projects.find(document);
     if (!isOpen() || !project || !isRange(start, end))
         return Refused;
-    *clipboard = static_cast<FObject*>(makeCounted<RangeContent>(allButRulers(*project), start, end).detach());
+    auto content = makeCounted<RangeContent>(*project, allButRulers(*project), start, end);
+    *clipboard = static_cast<FObject*>(content.detach());
     return ResultOk;
 }
 

@@ -35,6 +35,9 @@ public:
     /// transaction is open or another entry is on its way, and when there is no such entry.
     bool undo(Project& project);
     bool redo(Project& project);
+    /// Ends a transaction that was left open by those who were told of the closing of a project, which isn't looked into.
+    /// What was edited in others becomes an entry there, of which nobody is told before the next idle call.
+    void endAfterClosing(Project& closed);
 
     // IEditService
     Velmark::int32 copyRange(Velmark::IProjectDocument* project, Velmark::IObjectList* tracks, Velmark::int32 reserved,

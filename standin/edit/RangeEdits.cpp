@@ -5,7 +5,6 @@
 #include "standin/project/Project.h"
 
 #include <algorithm>
-#include <optional>
 
 using namespace Velmark;
 
@@ -13,31 +12,13 @@ namespace standin {
 
 namespace {
 
-/// A stretch of an event, in seconds of its track.
-struct Stretch {
-    double start;
-    double end;
-};
-
-/// What an event has in a range; nothing when it reaches less far in than to another instant.
-std::optional<Stretch> stretchIn(const Event& event, double start, double end)
-{
-    if (event.length() < 2.0 * SameInstant) {
-        // Too short to be cut: it is there where it begins.
-        const bool begins = event.start() > start - SameInstant && event.start() <= end - SameInstant;
-        return begins ? std::optional(Stretch{event.start(), event.end()}) : std::nullopt;
-    }
-    const Stretch common{std::max(event.start(), start), std::min(event.end(), end)};
-    return common.end - common.start >= SameInstant ? std::optional(common) : std::nullopt;
-}
-
 /// Those that have something in a range, in order.
 std::vector<Counted<Event>> eventsIn(const Track& track, double start, double end)
 {
     std::vector<Counted<Event>> events;
     track.visitTouching(start - SameInstant, end, [&](Node& child) {
         auto& event = static_cast<Event&>(child);
-        if (stretchIn(event, start, end))
+        if (event.stretchIn(start, end))
             events.push_back(Counted<Event>::share(&event));
     });
     return events;
@@ -56,7 +37,7 @@ bool isEmptyRange(double start, double end)
 void copyEvents(const Track& from, double start, double end, Track& to, double destination)
 {
     for (const Counted<Event>& event : eventsIn(from, start, end)) {
-        const Stretch stretch = *stretchIn(*event, start, end);
+        const Event::Stretch stretch = *event->stretchIn(start, end);
         const Counted<Event> piece = event->cutOut(stretch.start, stretch.end);
         const double offset = std::max(stretch.start - start, 0.0);
         piece->setSpan(destination + offset, destination + std::max(stretch.end - start, offset));
@@ -70,7 +51,7 @@ void copyEvents(const Track& from, double start, double end, Track& to, double d
 void clearEvents(Track& track, double start, double end)
 {
     for (const Counted<Event>& event : eventsIn(track, start, end)) {
-        const Stretch stretch = *stretchIn(*event, start, end);
+        const Event::Stretch stretch = *event->stretchIn(start, end);
         if (stretch.start - event->start() >= SameInstant)
             event->cutOut(event->start(), stretch.start)->takePlaceOf(*event);
         else
@@ -95,7 +76,8 @@ Event* continuationOf(const Event& event)
 
 } // namespace
 
-RangeContent::RangeContent(const std::vector<Track*>& tracks, double start, double end) : m_length(end - start)
+RangeContent::RangeContent(const Project& project, const std::vector<Track*>& tracks, double start, double end)
+    : m_project(project.link()), m_length(end - start)
 {
     if (isEmptyRange(start, end))
         return;
@@ -112,7 +94,7 @@ RangeContent::RangeContent(const std::vector<Track*>& tracks, double start, doub
 
 bool RangeContent::isOf(const Project& project) const
 {
-    return std::ranges::all_of(m_tracks, [&](const TrackContent& each) { return each.track->home() == &project; });
+    return m_project == project.link();
 }
 
 void RangeContent::writeAt(double destination) const

@@ -19,11 +19,11 @@ public:
     static constexpr const char* ClassName = "RangeContent";
 
     /// Clips, range markers and parts are cut at the edges; a point marker at `end` stays behind.
-    RangeContent(const std::vector<Track*>& tracks, double start, double end);
+    RangeContent(const Project& project, const std::vector<Track*>& tracks, double start, double end);
 
     /// In seconds.
     double length() const { return m_length; }
-    /// Whether all that is in it comes from that project.
+    /// Whether it was read from that project.
     bool isOf(const Project& project) const;
     /// Clears the range of the same length at `destination` on the tracks and writes the content there. What would fall
     /// below time 0 is dropped. Tracks that are in no project any more are passed over.
@@ -35,6 +35,7 @@ private:
         Velmark::Counted<Track> content; ///< which lies from 0 to the length of the range
     };
 
+    Velmark::Counted<ProjectLink> m_project;
     double m_length;
     std::vector<TrackContent> m_tracks;
 };

@@ -16,6 +16,14 @@ std::string digitsOf(double number)
     return digits;
 }
 
+/// A number that has a point in the file has one here, too.
+std::string digitsOf(JsonValue number)
+{
+    std::string digits;
+    number.appendTo(digits);
+    return digits;
+}
+
 } // namespace
 
 void JsonPlace::refuse(const std::string& fault) const
@@ -87,7 +95,7 @@ int JsonMembers::wholeNumber(std::string_view key, int least, int most) const
     number(key, least, most);
     const std::optional<std::int64_t> integer = value.integer();
     if (!integer)
-        refuse(key, "is " + digitsOf(value.number()) + ", not a whole number");
+        refuse(key, "is " + digitsOf(value) + ", not a whole number");
     return static_cast<int>(*integer);
 }
 

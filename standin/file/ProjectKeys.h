@@ -1,6 +1,7 @@
 #pragma once
 
 #include <array>
+#include <cmath>
 #include <span>
 #include <string_view>
 
@@ -85,5 +86,11 @@ inline constexpr std::string_view FormatName = "stage";
 inline constexpr int LargestNumber = 1'000'000'000;
 inline constexpr double LowestFrameRate = 1.0;
 inline constexpr double HighestFrameRate = 1000.0;
+
+/// Whether timecode of that rate can be drop-frame: at 30 frames per second, exactly or rounded (SMPTE ST 12-1).
+inline bool hasDropFrame(double framesPerSecond)
+{
+    return std::round(framesPerSecond) == 30.0;
+}
 
 } // namespace standin

@@ -89,8 +89,11 @@ void ProjectReader::readClock(const JsonMembers& members)
 {
     FrameRateInfo rate;
     rate.framesPerSecond = members.number(Key::FramesPerSecond, LowestFrameRate, HighestFrameRate);
-    if (members.flag(Key::DropFrame))
+    if (members.flag(Key::DropFrame)) {
+        if (!hasDropFrame(rate.framesPerSecond))
+            members.refuse(Key::DropFrame, "is true, but timecode is drop-frame at 30 frames per second (29.97) alone");
         rate.flags |= FrameRateInfo::Flag::DropFrame;
+    }
     if (members.flag(Key::PulledDown))
         rate.flags |= FrameRateInfo::Flag::PulledDown;
     m_project.setFrameRate(rate);

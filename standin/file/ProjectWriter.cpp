@@ -56,11 +56,16 @@ bool isStored(const Attribute& attribute)
     return attribute.isPersistent && (!std::holds_alternative<Counted<FUnknown>>(attribute.value) || listIn(attribute));
 }
 
+bool hasStoredAttributes(const Node& node)
+{
+    return std::ranges::any_of(node.attributes(), [](const auto& attribute) { return isStored(attribute.second); });
+}
+
 /// Whether something of the curve would be lost without it. Those that a new track has come by themselves.
 bool isWorthStoring(const Envelope& curve, const Track& newTrack)
 {
     return !newTrack.curves().contains(curve.number()) || curve.childCount() > 0 || !curve.name().empty() ||
-           curve.selected() || !curve.attributes().empty() || !curve.unknownMembers().empty();
+           curve.selected() || hasStoredAttributes(curve) || !curve.unknownMembers().empty();
 }
 
 } // namespace
@@ -93,8 +98,11 @@ void ProjectWriter::writeClock()
 {
     const FrameRateInfo& rate = m_project.frameRate();
     writeNumber(Key::FramesPerSecond, rate.framesPerSecond, LowestFrameRate, HighestFrameRate);
+    const bool isDropFrame = (rate.flags & FrameRateInfo::Flag::DropFrame) != 0;
     m_json.key(Key::DropFrame);
-    m_json.boolean((rate.flags & FrameRateInfo::Flag::DropFrame) != 0);
+    if (isDropFrame && !hasDropFrame(rate.framesPerSecond))
+        refuse("drop-frame at another rate than 30 frames per second");
+    m_json.boolean(isDropFrame);
     m_json.key(Key::PulledDown);
     m_json.boolean((rate.flags & FrameRateInfo::Flag::PulledDown) != 0);
     writeSeconds(Key::TimeOrigin, m_project.timeOrigin(), AnyTime);
@@ -246,21 +254,19 @@ void ProjectWriter::writeName(const Node& node)
 void ProjectWriter::writeDetails(const Node& node, KnownKeys known, Layout layout)
 {
     writeFlag(Key::Selected, node.selected());
-    if (!node.attributes().empty())
-        writeAttributes(node, layout);
+    writeAttributes(node, layout);
     if (!node.unknownMembers().empty())
         writeUnknownMembers(node, known);
 }
 
 void ProjectWriter::writeAttributes(const Node& node, Layout layout)
 {
-    const auto isKept = [](const auto& attribute) { return isStored(attribute.second); };
-    if (std::ranges::none_of(node.attributes(), isKept))
+    if (!hasStoredAttributes(node))
         return;
     m_json.key(Key::Attributes);
     m_json.beginObject(layout);
     for (const auto& attribute : node.attributes()) {
-        if (!isKept(attribute))
+        if (!isStored(attribute.second))
             continue;
         writeKey(attribute.first);
         writeAttribute(attribute.second, layout);

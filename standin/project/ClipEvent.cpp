@@ -16,7 +16,7 @@ IMediaClip* ClipEvent::getClip()
 int32 ClipEvent::setClip(IMediaClip* clip, int32 /*flags*/)
 {
     auto* const ours = dynamic_cast<MediaClip*>(clip);
-    if (clip && (!ours || !ours->project() || (project() && ours->project() != project())))
+    if (clip && (!ours || !ours->project() || !canBelongTo(*ours->project())))
         return ResultFalse;
     setClip(Counted<MediaClip>::share(ours));
     return ResultOk;

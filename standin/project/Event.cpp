@@ -2,6 +2,7 @@
 
 #include "standin/project/Track.h"
 
+#include <algorithm>
 #include <cmath>
 #include <string_view>
 #include <typeinfo>
@@ -31,6 +32,16 @@ bool Event::isType(const char* word)
 IEventNode* Event::getOwner()
 {
     return dynamic_cast<Event*>(parent());
+}
+
+std::optional<Event::Stretch> Event::stretchIn(double start, double end) const
+{
+    if (length() < 2.0 * SameInstant) {
+        const bool begins = this->start() > start - SameInstant && this->start() <= end - SameInstant;
+        return begins ? std::optional(Stretch{this->start(), this->end()}) : std::nullopt;
+    }
+    const Stretch common{std::max(this->start(), start), std::min(this->end(), end)};
+    return common.end - common.start >= SameInstant ? std::optional(common) : std::nullopt;
 }
 
 Counted<Event> Event::cutOut(double start, double end) const

@@ -4,6 +4,7 @@
 #include "velmark/Events.h"
 
 #include <cstdint>
+#include <optional>
 
 namespace standin {
 
@@ -18,6 +19,14 @@ public:
     bool accepts(const Node& /*child*/) const override { return false; }
     bool holdsChildren() const override { return false; }
 
+    /// A stretch of the event, in seconds of its container.
+    struct Stretch {
+        double start;
+        double end;
+    };
+    /// What it has in a range; nothing when it reaches less far in than to another instant (SameInstant). When it is too
+    /// short to be cut, all of it is there where it begins.
+    std::optional<Stretch> stretchIn(double start, double end) const;
     /// A new event, not inserted: this one cut to `start` to `end`, which are seconds in its container and lie within it. It
     /// stands at `start`. All travels with it: name, attributes, selection, source offset, the content of a part.
     Velmark::Counted<Event> cutOut(double start, double end) const;

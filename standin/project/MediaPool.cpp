@@ -3,6 +3,7 @@
 #include "standin/project/Project.h"
 
 #include <limits>
+#include <string_view>
 
 using namespace Velmark;
 
@@ -16,21 +17,13 @@ MediaPool::~MediaPool()
 
 int32 MediaPool::count(const char* type)
 {
-    int32 count = 0;
-    for (const auto& [number, clip] : m_clips)
-        count += clip->isType(type) ? 1 : 0;
-    return count;
+    return static_cast<int32>(clipsOf(type).size());
 }
 
 IProjectNode* MediaPool::itemAt(int32 index, const char* type)
 {
-    if (index < 0)
-        return nullptr;
-    for (const auto& [number, clip] : m_clips) {
-        if (clip->isType(type) && index-- == 0)
-            return clip.get();
-    }
-    return nullptr;
+    const std::span<MediaClip* const> clips = clipsOf(type);
+    return index >= 0 && index < std::ssize(clips) ? clips[static_cast<std::size_t>(index)] : nullptr;
 }
 
 FUnknown* MediaPool::import(IFilePath* path)
@@ -49,6 +42,23 @@ MediaClip* MediaPool::clipWith(int number) const
 {
     const auto found = m_clips.find(number);
     return found != m_clips.end() ? found->second.get() : nullptr;
+}
+
+std::span<MediaClip* const> MediaPool::clipsOf(const char* type)
+{
+    // Clips never go, so as many as there are have all been sorted.
+    if (m_audio.size() + m_video.size() != m_clips.size()) {
+        m_audio.clear();
+        m_video.clear();
+        for (const auto& [number, clip] : m_clips)
+            (clip->kind() == MediaClip::Kind::Audio ? m_audio : m_video).push_back(clip.get());
+    }
+    const std::string_view asked = type ? type : "";
+    if (asked == TypeWord::Audio)
+        return m_audio;
+    if (asked == TypeWord::Video)
+        return m_video;
+    return {};
 }
 
 int MediaPool::freeNumber() const

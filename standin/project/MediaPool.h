@@ -3,6 +3,7 @@
 #include "standin/project/MediaClip.h"
 
 #include <map>
+#include <span>
 #include <vector>
 
 namespace standin {
@@ -37,9 +38,14 @@ private:
     friend class Project;
 
     int freeNumber() const;
+    /// The clips of the type word, in the order of their numbers.
+    std::span<MediaClip* const> clipsOf(const char* type);
 
     Project* m_project;
     std::map<int, Velmark::Counted<MediaClip>> m_clips;
+    // What clipsOf gives, so that a walk over a large pool by index takes no time.
+    std::vector<MediaClip*> m_audio;
+    std::vector<MediaClip*> m_video;
 };
 
 } // namespace standin

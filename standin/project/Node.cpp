@@ -26,6 +26,14 @@ public:
     IProjectNode* next() override { return nullptr; }
 };
 
+/// A copy of a list of attributes; null for any other object. Lists go in and out as copies, so that nothing changes in the
+/// project behind the back of its undo list.
+Counted<FUnknown> copyOfList(FUnknown* object)
+{
+    const auto* const list = dynamic_cast<AttributeList*>(object);
+    return list ? Counted<FObject>(makeCounted<AttributeList>(*list)) : nullptr;
+}
+
 /// Nothing for a value that no attribute can have.
 std::optional<Attribute> readAttribute(const FVariant& value, bool persistent)
 {
@@ -34,7 +42,9 @@ std::optional<Attribute> readAttribute(const FVariant& value, bool persistent)
     if (const char* const text = value.asString(); text && isWellFormed(text))
         return Attribute{std::string(text), persistent};
     FUnknown* const object = value.asObject();
-    if (object && (!persistent || dynamic_cast<AttributeList*>(object)))
+    if (auto copy = copyOfList(object))
+        return Attribute{std::move(copy), persistent};
+    if (object && !persistent)
         return Attribute{Counted<FUnknown>::share(object), persistent};
     return std::nullopt;
 }
@@ -42,7 +52,11 @@ std::optional<Attribute> readAttribute(const FVariant& value, bool persistent)
 struct ToVariant {
     FVariant operator()(int64 integer) const { return FVariant::integer(integer); }
     FVariant operator()(const std::string& text) const { return FVariant::string(text.c_str()); }
-    FVariant operator()(const Counted<FUnknown>& object) const { return FVariant::object(object.get()); }
+    FVariant operator()(const Counted<FUnknown>& object) const
+    {
+        const Counted<FUnknown> copy = copyOfList(object.get());
+        return FVariant::object(copy ? copy.get() : object.get());
+    }
 };
 
 } // namespace
@@ -97,7 +111,7 @@ int32 Node::setName(FUnknown* /*container*/, IString* name, int32 /*reserved*/)
 
 double Node::getStart(FUnknown* container)
 {
-    return start() - offsetOf(container).value_or(0.0);
+    return start() - offsetOf(container).value_or(-parentStart());
 }
 
 int32 Node::setStart(FUnknown* container, int32 /*reserved*/, double seconds)
@@ -118,7 +132,7 @@ int32 Node::setLength(FUnknown* container, FUnknown* /*transaction*/, double sec
 
 double Node::getEnd(FUnknown* container)
 {
-    return end() - offsetOf(container).value_or(0.0);
+    return lastEnd() - offsetOf(container).value_or(-parentStart());
 }
 
 int32 Node::setEnd(FUnknown* container, int32 /*reserved*/, double seconds)
@@ -245,12 +259,26 @@ void Node::markContentChanged()
     project->mark(*project, ChangeFlag::Content);
 }
 
+bool Node::canBelongTo(const Project& project)
+{
+    const ProjectLink* const home = this->home();
+    return !home || home->project == &project;
+}
+
+const ProjectLink* Node::home()
+{
+    Node* node = this;
+    while (node && !node->m_home)
+        node = static_cast<Node*>(node->getParent());
+    return node ? node->m_home.get() : nullptr;
+}
+
 Project* Node::recordingProject()
 {
     Project* project = this->project();
     // What was taken out comes back when that is undone, and has to be what it was.
-    for (Node* node = this; node && !project; node = static_cast<Node*>(node->getParent()))
-        project = node->m_home ? node->m_home->project : nullptr;
+    if (const ProjectLink* const home = project ? nullptr : this->home())
+        project = home->project;
     return project && project->isOpen() && project->log().isOpen() ? project : nullptr;
 }
 

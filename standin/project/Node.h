@@ -67,15 +67,15 @@ public:
     /// The node itself, or the nearest above it, that is such; null when there is none.
     virtual Project* project();
     virtual Track* track();
-    /// The project that it was in; null when it never was in one and when that has gone.
-    const Project* home() const { return m_home ? m_home->project : nullptr; }
-    /// Whether it may be put into the project: a node that has been in one is known to the undo list there, and not fit for
-    /// another.
-    bool canBelongTo(const Project& project) const { return !m_home || home() == &project; }
+    /// Whether it is in the project or may be put into it: a node that has been in one is known to the undo list there, and
+    /// not fit for another.
+    bool canBelongTo(const Project& project);
     /// Seconds from the start of the parent.
     double start() const { return TimeSpan::start; }
     double end() const { return TimeSpan::end; }
     double length() const { return end() - start(); }
+    /// The end that the interface gives, in seconds from the start of the parent: that of the content for what has no span.
+    virtual double lastEnd() const { return end(); }
     /// Seconds from the start of the project.
     double absoluteStart() const;
     double absoluteEnd() const;
@@ -165,7 +165,10 @@ private:
 
     void moveTo(Place place);
     void leaveParent();
-    /// The project that the node is in, or was in before it was taken out, when that is open and a transaction is; else null.
+    /// How the project is found that the node is in, or in which it was before it or something around it was taken out; null
+    /// when there was none.
+    const ProjectLink* home();
+    /// That project when it is open and a transaction is; else null.
     Project* recordingProject();
     static void record(Project& project, std::unique_ptr<Edit> edit);
 
@@ -180,7 +183,7 @@ private:
     Extras& extras();
 
     Container* m_parent = nullptr;
-    Velmark::Counted<ProjectLink> m_home; ///< to the project that it was in; null when it never was in one
+    Velmark::Counted<ProjectLink> m_home; ///< to the project into which it was put; null when only its container was
     std::u16string m_name;
     std::unique_ptr<Extras> m_extras;
     Velmark::uint8 m_marks = 0;

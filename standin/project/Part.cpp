@@ -3,6 +3,7 @@
 #include "standin/project/ClipEvent.h"
 
 #include <algorithm>
+#include <limits>
 #include <string_view>
 #include <vector>
 
@@ -29,17 +30,18 @@ bool Part::accepts(const Node& child) const
 Counted<Event> Part::makePiece(double offset, double length) const
 {
     auto piece = makeCounted<Part>();
-    const double end = offset + length;
-    visitTouching(offset, end, [&](const Node& child) {
-        const double from = std::max(child.start(), offset);
-        const double to = std::min(child.end(), end);
-        // What only touches the edges, or reaches less far in than to another instant, stays behind; but an event without a
-        // length is there where it begins.
-        if (child.length() > 0.0 ? to - from < SameInstant : child.start() >= end)
+    // What a part holds behind its end is heard again when that is moved, so the last piece has all of it.
+    const bool isLast = offset + length > this->length() - SameInstant;
+    const double end = isLast ? std::numeric_limits<double>::infinity() : offset + length;
+    visitTouching(offset - SameInstant, end, [&](const Node& child) {
+        const auto& event = static_cast<const Event&>(child);
+        const std::optional<Stretch> stretch = event.stretchIn(offset, end);
+        if (!stretch)
             return;
-        const Counted<Event> part = static_cast<const Event&>(child).cutOut(from, to);
-        part->setSpan(from - offset, to - offset);
-        part->insertInto(*piece);
+        const Counted<Event> cut = event.cutOut(stretch->start, stretch->end);
+        const double start = std::max(stretch->start - offset, 0.0);
+        cut->setSpan(start, std::max(stretch->end - offset, start));
+        cut->insertInto(*piece);
     });
     return piece;
 }

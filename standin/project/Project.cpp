@@ -131,11 +131,11 @@ double Project::getTimeOrigin()
     return m_timeOrigin;
 }
 
-double Project::getEnd(FUnknown* /*container*/)
+double Project::lastEnd() const
 {
     double latest = m_endTime;
     for (const Node* child = firstChild(); child; child = childBehind(*child))
-        latest = std::max(latest, static_cast<const Track&>(*child).lastEnd());
+        latest = std::max(latest, child->lastEnd());
     return latest;
 }
 

@@ -47,11 +47,9 @@ public:
     Velmark::int32 getFrameRate(Velmark::FrameRateInfo& info) override;
     double getTimeOrigin() override;
 
-    // IProjectNode
-    /// The later of the set end and the end of the last event or marker.
-    double getEnd(Velmark::FUnknown* container) override;
-
     Project* project() override { return this; }
+    /// The later of the set end and the end of the last event or marker.
+    double lastEnd() const override;
     bool accepts(const Node& child) const override;
 
     /// Where it is stored; empty for a project that never was.

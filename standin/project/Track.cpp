@@ -66,11 +66,6 @@ bool Track::isType(const char* word)
     return asked == TypeWord::Track || asked == wordOf(m_kind);
 }
 
-double Track::getEnd(FUnknown* /*container*/)
-{
-    return lastEnd();
-}
-
 int32 Track::setFlag(const char* name, bool value)
 {
     if (!name || std::string_view(name) != TrackFlag::Lock)
@@ -119,7 +114,7 @@ double Track::lastEnd() const
         return contentEnd();
     double latest = 0.0;
     for (const Node* child = firstChild(); child; child = childBehind(*child))
-        latest = std::max(latest, static_cast<const Track&>(*child).lastEnd());
+        latest = std::max(latest, child->lastEnd());
     return latest;
 }
 

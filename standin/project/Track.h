@@ -26,8 +26,6 @@ public:
     ~Track() override;
 
     bool isType(const char* word) override;
-    /// The end of its last event or marker or, for a folder, of that of its tracks.
-    double getEnd(Velmark::FUnknown* container) override;
     Velmark::int32 setFlag(const char* name, bool value) override;
     Velmark::int32 getFlag(const char* name) override;
     /// Null for a folder, a ruler and a marker track.
@@ -37,8 +35,8 @@ public:
     bool accepts(const Node& child) const override;
 
     Kind kind() const { return m_kind; }
-    /// In seconds of the project; see getEnd.
-    double lastEnd() const;
+    /// Of its last event or marker or, for a folder, of that of its tracks; in seconds of the project.
+    double lastEnd() const override;
     bool isFolder() const { return m_kind == Kind::Folder; }
     bool hasAutomation() const { return m_kind == Kind::Audio || m_kind == Kind::Video; }
     bool isLocked() const { return m_isLocked; }

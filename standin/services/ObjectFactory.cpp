@@ -20,9 +20,11 @@ FUnknown* ObjectFactory::createObject(const char* className, const char* typeNam
 
 int32 ObjectFactory::releaseObject(FUnknown* object)
 {
-    if (m_givenOut.erase(object) == 0)
+    // It may come back as any of its interfaces.
+    const auto identity = query<FUnknown>(object);
+    if (m_givenOut.erase(identity.get()) == 0)
         return ResultFalse;
-    object->release();
+    identity->release();
     return ResultOk;
 }
 

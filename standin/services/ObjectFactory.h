@@ -17,7 +17,7 @@ public:
     Velmark::int32 releaseObject(Velmark::FUnknown* object) override;
 
 private:
-    std::set<Velmark::FUnknown*> m_givenOut;
+    std::set<Velmark::FUnknown*> m_givenOut; ///< by their FUnknown, which is the same whichever interface was asked
 };
 
 } // namespace standin

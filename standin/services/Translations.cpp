@@ -1,7 +1,7 @@
 #include "standin/services/Translations.h"
 
+#include "standin/file/Utf16.h"
 #include "standin/project/Text.h"
-#include "velmark/String.h"
 
 #include <filesystem>
 #include <pugixml.hpp>
@@ -24,17 +24,25 @@ void require(bool condition)
         throw BrokenTable();
 }
 
-std::u16string toUtf16(const char* text)
+std::u16string checkedUtf16(std::string_view text)
 {
-    require(isWellFormed(std::string_view(text)));
-    return ConstString(text).text16();
+    require(isWellFormed(text));
+    return toUtf16(text);
 }
 
-/// The children of a node, all of which have to be elements of that name.
+bool isBlank(const pugi::xml_node& node)
+{
+    return node.type() == pugi::node_pcdata &&
+           std::string_view(node.value()).find_first_not_of(" \t\r\n") == std::string_view::npos;
+}
+
+/// The children of a node, all of which have to be elements of that name, with nothing but blanks between them.
 std::vector<pugi::xml_node> childrenNamed(std::string_view name, const pugi::xml_node& node)
 {
     std::vector<pugi::xml_node> children;
     for (const pugi::xml_node& child : node.children()) {
+        if (isBlank(child))
+            continue;
         require(child.name() == name);
         children.push_back(child);
     }
@@ -53,7 +61,7 @@ std::u16string textOf(const pugi::xml_node& node)
     std::u16string text;
     for (const pugi::xml_node& piece : node.children()) {
         require(piece.type() != pugi::node_element);
-        text += toUtf16(piece.value());
+        text += checkedUtf16(piece.value());
     }
     return text;
 }
@@ -67,8 +75,11 @@ int32 Translations::addTable(BundleHandle bundle, const char* file, const char* 
     const std::filesystem::path path = std::filesystem::path(static_cast<const char*>(bundle)) / file;
     std::error_code ignored;
     pugi::xml_document document;
+    // Blanks that stand alone may be part of a translation.
+    constexpr unsigned Options = pugi::parse_default | pugi::parse_ws_pcdata;
     // A folder can be opened too, but has no size that could be read.
-    if (!std::filesystem::is_regular_file(path, ignored) || !document.load_file(path.c_str()))
+    if (!std::filesystem::is_regular_file(path, ignored) ||
+        !document.load_file(path.c_str(), Options, pugi::encoding_utf8))
         return ResultFalse;
     try {
         for (auto& [language, table] : read(document))
@@ -86,7 +97,7 @@ Translations::Tables Translations::read(const pugi::xml_document& document)
         for (const pugi::xml_node& language : childrenNamed("language", root)) {
             Table& table = tables[requiredAttribute("name", language)];
             for (const pugi::xml_node& text : childrenNamed("text", language)) {
-                const std::u16string source = toUtf16(requiredAttribute("source", text));
+                const std::u16string source = checkedUtf16(requiredAttribute("source", text));
                 const std::u16string translated = textOf(text);
                 if (!translated.empty())
                     table.try_emplace(source, translated);

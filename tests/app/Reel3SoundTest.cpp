@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <gtest/gtest.h>
+#include <map>
 #include <nlohmann/json.hpp>
 #include <string>
 #include <vector>
@@ -107,6 +108,32 @@ TEST_F(Reel3Sound, Has300ClipsOnTwelveTracksInFolders)
 
     EXPECT_EQ(std::count_if(tracks.begin(), tracks.end(), isLaid), 12);
     EXPECT_EQ(soundClips().size(), 300U);
+}
+
+TEST_F(Reel3Sound, HasItsTracksInTheFoldersOfASoundEdit)
+{
+    std::map<std::string, std::vector<std::string>> folders;
+    for (const json& track : project().at("tracks")) {
+        if (track.at("folders").size() == 1U)
+            folders[track.at("folders").at(0)].push_back(track.at("name"));
+    }
+
+    EXPECT_EQ(folders.at("Dialogue"), (std::vector<std::string>{"DIA 1", "DIA 2", "DIA 3"}));
+    EXPECT_EQ(folders.at("Effects"), (std::vector<std::string>{"FX 1", "FX 2", "FX 3"}));
+    EXPECT_EQ(folders.at("Foley"), (std::vector<std::string>{"Feet", "Props"}));
+    EXPECT_EQ(folders.at("Atmospheres"), (std::vector<std::string>{"ATM 1", "ATM 2"}));
+    EXPECT_EQ(folders.at("Music"), (std::vector<std::string>{"MX 1", "MX 2"}));
+}
+
+TEST_F(Reel3Sound, IsMixedAndHasMemos)
+{
+    const json& volume = track("MX 1").at("automation").at(0);
+    const json& memos = track("Memos").at("events");
+
+    EXPECT_EQ(volume.at("name"), "volume");
+    EXPECT_GE(volume.at("points").size(), 10U);
+    EXPECT_GE(memos.size(), 5U);
+    EXPECT_TRUE(std::all_of(memos.begin(), memos.end(), [](const json& memo) { return memo.at("name") != ""; }));
 }
 
 TEST_F(Reel3Sound, HasTheTracksThatAConformKnowsByTheirRole)

@@ -84,6 +84,7 @@ TEST(Show, JsonHasTheFactsWithSecondsBesideTimecodes)
     const json project = showAsJson({folder.write("scene.stage", soundProject())});
 
     EXPECT_EQ(project.at("file"), "scene.stage");
+    EXPECT_EQ(project.at("name"), "");
     EXPECT_EQ(project.at("frameRate"),
               json::parse(R"({"label": "24 fps", "framesPerSecond": 24, "dropFrame": false, "pulledDown": false})"));
     EXPECT_EQ(project.at("timeOrigin"), json::parse(R"({"seconds": 3600, "timecode": "01:00:00:00"})"));
@@ -295,6 +296,15 @@ TEST(Show, TheStoredListsOfAProjectAreShownWithTheirSizes)
     EXPECT_EQ(showAsJson({file}).at("attributes"), json::parse(R"({"CaDr": {"CaDrData": {"bytes": 4}}, "CaDs": 5})"));
 }
 
+TEST(Show, TheProjectIsShownUnderItsName)
+{
+    const TempFolder folder;
+    const std::string file = folder.write("r3.stage", projectWith("", R"("name": "Reel \u2462",)"));
+
+    EXPECT_TRUE(runCadrel({"show", file}).out.starts_with("Project      r3.stage\nName         Reel \xe2\x91\xa2\n"));
+    EXPECT_EQ(showAsJson({file}).at("name"), "Reel \xe2\x91\xa2");
+}
+
 TEST(Show, AnEmptyProjectIsShown)
 {
     const TempFolder folder;
@@ -461,7 +471,7 @@ TEST(BadProject, ARateAtWhichNoTimecodeCounts)
     const TempFolder folder;
     const std::string file = folder.write("rate.stage", projectAt(24, true, false, 0));
 
-    expectStopped(runCadrel({"show", file}), file, "has a frame rate at which no timecode counts; correct the rate");
+    expectBroken(file, "dropFrame: is true, but timecode is drop-frame at 30 frames per second (29.97) alone");
 }
 
 TEST(BadProject, ALineOf100Megabytes)

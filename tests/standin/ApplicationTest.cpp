@@ -103,6 +103,22 @@ TEST(Application, AFileThatCannotBeReadOpensNothing)
     EXPECT_EQ(service<IProjectManager>(host.context())->projectCount(), 1);
 }
 
+TEST(Application, AFileWhoseNameIsNoTextIsNeitherOpenedNorSaved)
+{
+    TestHost host;
+    const TempFolder folder;
+    host.application.saveProject(host.project, folder / "a.stage");
+    const std::filesystem::path path = folder.write("caf\xe9.stage", contentOf(folder / "a.stage"));
+
+    EXPECT_THROW(host.application.openProject(path), ProjectFileError);
+    EXPECT_THROW(host.application.saveProject(host.project, folder / "caf\xe8.stage"), ProjectFileError);
+    EXPECT_THROW(host.application.saveProject(host.project, ""), ProjectFileError);
+
+    EXPECT_EQ(service<IProjectManager>(host.context())->projectCount(), 1);
+    EXPECT_EQ(host.project.path(), (folder / "a.stage").u16string());
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"a.stage", "caf\xe9.stage"}));
+}
+
 TEST(Application, WhatIsOpenedWithinATransactionIsNoEdit)
 {
     TestHost host;

@@ -16,6 +16,7 @@
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
+#include <limits>
 #include <string>
 #include <vector>
 
@@ -232,9 +233,22 @@ private:
         }
     }
 
-    /// In quarters of seconds, so that edges meet, or anywhere.
+    /// In quarters of seconds, so that edges meet, or anywhere; and now and then what is hardly a time, or none.
     double time()
     {
+        static constexpr double Infinity = std::numeric_limits<double>::infinity();
+        static constexpr double OddTimes[] = {std::numeric_limits<double>::quiet_NaN(),
+                                              Infinity,
+                                              -Infinity,
+                                              -1.0,
+                                              -0.0,
+                                              SameInstant / 2.0,
+                                              -SameInstant / 2.0,
+                                              Project::FurthestTime / 2.0,
+                                              Project::FurthestTime,
+                                              2.0 * Project::FurthestTime};
+        if (m_chance.oneIn(10))
+            return m_chance.oneOf(OddTimes);
         const auto quarters = static_cast<double>(m_chance.below(400));
         return m_chance.oneIn(3) ? quarters / 7.0 : quarters / 4.0;
     }
@@ -324,6 +338,18 @@ RC_GTEST_PROP(EditLaw, EditsBetweenUndosAreUndoneInLargerProjects, (std::uint64_
     Editing editing(chance, {8, 12, 12, 8, 100.0});
 
     checkEditsBetweenUndos(editing, chance, 15);
+}
+
+RC_GTEST_PROP(EditLaw, WhateverWasEditedIsReadBackAsItWasStored, (std::uint64_t seed))
+{
+    SeededChance chance(seed);
+    Editing editing(chance);
+    for (int count = 0; count < 10; ++count)
+        editing.edit();
+    const std::string stored = editing.dump();
+
+    ChangeLog log;
+    RC_ASSERT(ProjectFile::toText(*ProjectFile::parse(stored, "test.stage", log)) == stored);
 }
 
 RC_GTEST_PROP(EditLaw, ChildrenStandByTheirStartAndInTheirParent, (std::uint64_t seed))

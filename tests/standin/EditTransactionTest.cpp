@@ -1,6 +1,8 @@
 #include "tests/standin/TestHost.h"
 
+#include "standin/ProjectManager.h"
 #include "standin/edit/EditService.h"
+#include "standin/file/ProjectFile.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Part.h"
 #include "standin/project/Track.h"
@@ -303,6 +305,20 @@ TEST(EditTransaction, InsertRefusesAnEventThatWouldBeginBeforeItsPart)
     host.transaction()->commit(host.document(), u"Edit");
 
     EXPECT_EQ(fresh->getStart(nullptr), 19.0);
+}
+
+TEST(EditTransaction, WhatLiesBeyondAllTimeDoesNotGoToAnotherPlace)
+{
+    HostWithProject host;
+    host.inPart->setEnd(nullptr, 0, Project::FurthestTime);
+    host.part->setStart(nullptr, 0, 1000.0);
+    const std::string before = host.dump();
+
+    host.transaction()->begin(true);
+    EXPECT_NE(host.transaction()->move(host.root(), host.track.get(), host.inPart.get()), ResultOk);
+    host.transaction()->commit(host.document(), u"Edit");
+
+    EXPECT_EQ(host.dump(), before);
 }
 
 TEST(EditTransaction, InsertRefusesWhatPlaysAClipOfAnotherPool)
@@ -816,6 +832,31 @@ TEST(EditTransaction, ClosingAProjectCommitsWhatIsOpen)
     EXPECT_EQ(host.clip->getStart(nullptr), 10.0);
 }
 
+TEST(EditTransaction, OneThatIsLeftOpenWhileAProjectClosesIsEnded)
+{
+    HostWithProject host;
+    const auto second = Counted<Project>::share(&host.application.createProject());
+    const auto inSecond = host.addTrack(TypeWord::Audio, u"A", second.get());
+    Calls calls;
+    const auto listener = makeCounted<Recorder>(calls);
+    listener->whenCalled = [&](const std::string&) {
+        host.transaction()->begin(true);
+        inSecond->setName(nullptr, text(u"B").get(), 0);
+        host.clip->setStart(nullptr, 0, 1.0);
+    };
+    service<IProjectManager>(host.context())->addNotification(listener.get());
+
+    host.application.closeProject(*second);
+    service<IProjectManager>(host.context())->removeNotification(listener.get());
+
+    EXPECT_EQ(calls, Calls{"closing"});
+    EXPECT_EQ(second->refCount(), 1);
+    EXPECT_EQ(host.transaction()->begin(true), ResultOk);
+    host.transaction()->commit(host.document(), u"Nothing");
+    EXPECT_TRUE(host.undo());
+    EXPECT_EQ(host.clip->getStart(nullptr), 10.0);
+}
+
 TEST(EditTransaction, AClosedProjectIsNotReverted)
 {
     TestHost host;
@@ -973,6 +1014,22 @@ TEST(EditTransaction, PasteWritesWhatCopyAllHasRead)
     EXPECT_EQ(namesOf(*host.memos), (Names{u"memo", u"memo"}));
     EXPECT_EQ(namesOf(*host.track), (Names{u"line", u"next", u"line", u"next"}));
     EXPECT_EQ(childrenOf(*host.track)[2]->getStart(nullptr), 105.0);
+}
+
+TEST(EditTransaction, PasteWritesOnTracksThatWereLoadedInTheirFolder)
+{
+    HostWithProject host;
+    const auto log = &host.application.edits().log();
+    Project& loaded = host.application.projects().add(ProjectFile::parse(host.dump(), "test.stage", *log));
+    host.transaction()->begin(true);
+
+    Counted<FUnknown> clipboard;
+    EXPECT_EQ(host.transaction()->copyAll(&loaded, clipboard.out(), 5.0, 13.0, 0), ResultOk);
+    EXPECT_EQ(host.transaction()->paste(&loaded, clipboard.get(), 0, 100.0), ResultOk);
+    host.transaction()->commit(&loaded, u"Paste");
+
+    const auto folder = childrenOf(loaded)[0];
+    EXPECT_EQ(namesOf(*childrenOf(*folder)[0]), (Names{u"line", u"next", u"line", u"next"}));
 }
 
 TEST(EditTransaction, AClipboardIsForItsProjectAlone)

@@ -95,6 +95,29 @@ TEST(ClipEvent, RefusesAClipOfAnotherHostOrAnotherProject)
     EXPECT_EQ(event->getClip(), &media);
 }
 
+TEST(ClipEvent, RefusesAClipOfAnotherProjectWhileItIsTakenOut)
+{
+    TestHost host;
+    const auto track = host.addTrack(TypeWord::Audio, u"FX");
+    const auto event = host.addClip(track, u"door", 1.0, 2.0);
+    const auto part = host.addPart(track, u"storm", 10.0, 20.0);
+    const auto inPart = host.addClip(part, u"thunder", 12.0, 13.0);
+    const std::string before = host.dump();
+    Project& other = host.application.createProject();
+    const auto ofOther = makeCounted<MediaClip>(MediaClip::Kind::Audio, u"/other.wav", 1.0);
+    other.pool().add(ofOther);
+    host.edit(u"Delete", [&] {
+        host.transaction()->remove(track.get(), event.get());
+        host.transaction()->remove(track.get(), part.get());
+    });
+
+    EXPECT_NE(query<IClipEvent>(event)->setClip(ofOther.get(), 0), ResultOk);
+    EXPECT_NE(query<IClipEvent>(inPart)->setClip(ofOther.get(), 0), ResultOk);
+
+    EXPECT_TRUE(host.undo());
+    EXPECT_EQ(host.dump(), before);
+}
+
 //     the event    10|--------------|18      from 3 s of its clip on
 //     the piece         12|----|15           from 5 s on
 TEST(Event, APieceOfAClipPlaysWhatTheEventPlaysThere)
@@ -177,6 +200,44 @@ TEST(Event, WhatOnlyTouchesThePieceOfAPartStaysBehind)
     ASSERT_EQ(piece->childCount(), 1U);
     EXPECT_EQ(piece->firstChild()->start(), 0.0);
     EXPECT_EQ(piece->firstChild()->end(), 0.0);
+}
+
+TEST(Event, WhatIsTooShortToBeCutIsInThePieceOfAPartInWhichItBegins)
+{
+    const auto part = makeCounted<Part>();
+    part->setSpan(0.0, 100.0);
+    clipEvent(5.0, 5.000001, 0.0)->insertInto(*part);
+    clipEvent(9.999998, 10.000002, 0.0)->insertInto(*part);
+    clipEvent(30.0, 30.000003, 0.0)->insertInto(*part);
+
+    const auto first = part->cutOut(0.0, 10.0);
+    const auto second = part->cutOut(10.0, 100.0);
+
+    ASSERT_EQ(first->childCount(), 1U);
+    EXPECT_EQ(first->firstChild()->start(), 5.0);
+    ASSERT_EQ(second->childCount(), 2U);
+    EXPECT_EQ(second->firstChild()->start(), 0.0);
+    EXPECT_EQ(second->lastChild()->start(), 20.0);
+}
+
+//     the part      |---- a ----|..b..|      b stands behind the end of the part, where nobody hears it
+//     the pieces    |-- a --|
+//                           | a |..b..|
+TEST(Event, TheLastPieceOfAPartHasWhatThePartHoldsBehindItsEnd)
+{
+    const auto part = makeCounted<Part>();
+    part->setSpan(100.0, 110.0);
+    clipEvent(0.0, 10.0, 0.0)->insertInto(*part);
+    clipEvent(10.0, 14.0, 0.0)->insertInto(*part);
+
+    const auto first = part->cutOut(100.0, 106.0);
+    const auto last = part->cutOut(106.0, 110.0);
+
+    EXPECT_EQ(first->childCount(), 1U);
+    EXPECT_EQ(last->end(), 110.0);
+    ASSERT_EQ(last->childCount(), 2U);
+    EXPECT_EQ(last->lastChild()->start(), 4.0);
+    EXPECT_EQ(last->lastChild()->end(), 8.0);
 }
 
 TEST(Event, PiecesThatStandSideBySideContinueEachOther)

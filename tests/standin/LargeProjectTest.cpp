@@ -4,6 +4,7 @@
 
 #include "standin/project/Track.h"
 #include "velmark/Events.h"
+#include "velmark/Media.h"
 #include "velmark/Tracks.h"
 
 #include <gtest/gtest.h>
@@ -116,6 +117,26 @@ TEST(LargeProject, NoEditIsQuadraticInClips)
 
     const double few = std::max(secondsToEdit(2500), secondsToEdit(2500));
     const double many = std::min(secondsToEdit(10000), secondsToEdit(10000));
+
+    EXPECT_LT(many, 8.0 * few);
+}
+
+TEST(LargeProject, AWalkOverTheMediaPoolByIndexIsNotQuadratic)
+{
+    const auto secondsToWalk = [](int clips) {
+        TestHost host;
+        for (int index = 0; index < clips; ++index)
+            host.addMedia(u"/sound/take.wav", 1.0);
+        IMediaPool* const pool = host.document()->getMediaPool();
+        return secondsOf([&] {
+            for (int32 index = 0; index < pool->count(TypeWord::Audio); ++index)
+                pool->itemAt(index, TypeWord::Audio)->getName();
+        });
+    };
+    secondsToWalk(1000);
+
+    const double few = std::max(secondsToWalk(10000), secondsToWalk(10000));
+    const double many = std::min(secondsToWalk(40000), secondsToWalk(40000));
 
     EXPECT_LT(many, 8.0 * few);
 }

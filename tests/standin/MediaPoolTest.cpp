@@ -46,6 +46,24 @@ TEST(MediaPool, GivesTheItemsOfAKindByIndex)
     EXPECT_EQ(std::u16string(host.pool()->itemAt(0, TypeWord::Video)->getName()), u"reel3");
 }
 
+TEST(MediaPool, GivesTheItemsByTheirNumbersWheneverTheyCame)
+{
+    TestHost host;
+    MediaPool& pool = host.project.pool();
+    const auto add = [&](const char16_t* path, int number) {
+        pool.add(makeCounted<MediaClip>(MediaClip::Kind::Audio, path, 1.0), number);
+    };
+    add(u"/b.wav", 7);
+    add(u"/c.wav", 9);
+    EXPECT_EQ(std::u16string(pool.itemAt(0, TypeWord::Audio)->getName()), u"b");
+
+    add(u"/a.wav", 3);
+
+    EXPECT_EQ(pool.count(TypeWord::Audio), 3);
+    EXPECT_EQ(std::u16string(pool.itemAt(0, TypeWord::Audio)->getName()), u"a");
+    EXPECT_EQ(std::u16string(pool.itemAt(2, TypeWord::Audio)->getName()), u"c");
+}
+
 TEST(MediaPool, HasNothingAtAnIndexThatIsNotThere)
 {
     HostWithPool host;

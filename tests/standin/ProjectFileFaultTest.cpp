@@ -92,6 +92,7 @@ TEST(ProjectFileFault, IsAnotherVersion)
               "reel.stage: version: is 2: written by a newer version than this one, which knows 1");
     EXPECT_EQ(faultOf(R"({"format": "stage", "version": 0})"), "reel.stage: version: is 0, not from 1 to 2147483647");
     EXPECT_EQ(faultOf(R"({"format": "stage", "version": 1.5})"), "reel.stage: version: is 1.5, not a whole number");
+    EXPECT_EQ(faultOf(R"({"format": "stage", "version": 1.0})"), "reel.stage: version: is 1.0, not a whole number");
     EXPECT_EQ(faultOf(R"({"format": "stage", "version": "1"})"), "reel.stage: version: is a text, not a number");
 }
 
@@ -106,6 +107,21 @@ TEST(ProjectFileFault, IsAClockThatIsNone)
               "reel.stage: timeOrigin: is 10000000000, not from -1000000000 to 1000000000");
     EXPECT_EQ(faultOfProject(R"("cycleEnd": null)"), "reel.stage: cycleEnd: is null, not a number");
     EXPECT_EQ(faultOfProject(R"("position": 1e999)"), "reel.stage: line 1, column 74: a number beyond all bounds");
+}
+
+TEST(ProjectFileFault, IsDropFrameAtARateThatHasNone)
+{
+    const auto faultAt = [](const std::string& framesPerSecond) {
+        return faultOf(R"({"format": "stage", "version": 1, "dropFrame": true, "framesPerSecond": )" + framesPerSecond +
+                       "}");
+    };
+    const std::string fault =
+        "reel.stage: dropFrame: is true, but timecode is drop-frame at 30 frames per second (29.97) alone";
+
+    for (const char* rate : {"1", "23.976", "24", "25", "29.4", "30.6", "59.94", "60", "1000"})
+        EXPECT_EQ(faultAt(rate), fault) << rate;
+    for (const char* rate : {"29.97", "29.97002997002997", "30", "30.0"})
+        EXPECT_EQ(faultAt(rate), "none") << rate;
 }
 
 TEST(ProjectFileFault, IsAValueOfTheWrongType)
@@ -295,6 +311,7 @@ TEST(ProjectFileFault, IsNestingWithoutAnEnd)
         faultOf(projectWith("\"tracks\": [" + folders + "]")).ends_with(".tracks[0]: nested deeper than 100 levels"));
     EXPECT_TRUE(faultOfEvent(parts).ends_with(".events[0]: nested deeper than 100 levels"));
     EXPECT_EQ(faultOfProject("\"x\": " + lists), "reel.stage: x: nested deeper than 100 levels");
+    EXPECT_EQ(faultOfProject("\"x\": " + lists.substr(1, 200)), "none");
     EXPECT_EQ(faultOfEvent(R"({"kind": "clip", "start": 0, "end": 1, "x": )" + lists + "}"),
               "reel.stage: tracks[0].events[0].x: nested deeper than 100 levels");
     EXPECT_EQ(faultOf(countless), "reel.stage: line 1, column 305: nested deeper than 304 levels");

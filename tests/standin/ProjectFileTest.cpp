@@ -215,12 +215,12 @@ TEST_F(ProjectFileForm, HasAnEventAPointAndAClipOfThePoolOnALineEach)
 TEST_F(ProjectFileForm, GivesTheClockBack)
 {
     const auto project =
-        parse(R"({"format": "stage", "version": 1, "name": "Reel 3", "framesPerSecond": 23.976, "pulledDown": true,
+        parse(R"({"format": "stage", "version": 1, "name": "Reel 3", "framesPerSecond": 29.97, "pulledDown": true,
                   "dropFrame": true, "timeOrigin": 36000, "end": 90, "position": 7, "leftLocator": 1, "rightLocator": 2,
                   "cycleStart": 3, "cycleEnd": 4, "selected": true})");
 
     EXPECT_EQ(project->name(), u"Reel 3");
-    EXPECT_EQ(project->frameRate().framesPerSecond, 23.976);
+    EXPECT_EQ(project->frameRate().framesPerSecond, 29.97);
     EXPECT_EQ(project->frameRate().flags, FrameRateInfo::Flag::DropFrame | FrameRateInfo::Flag::PulledDown);
     EXPECT_EQ(project->timeOrigin(), 36000.0);
     EXPECT_EQ(project->setEndTime(), 90.0);
@@ -365,6 +365,16 @@ TEST_F(ProjectFileForm, LeavesOutAttributesThatGoWithTheSession)
 
     project->setAttribute("stored", Attribute{Velmark::int64{1}, true});
     EXPECT_TRUE(contains(ProjectFile::toText(*project), "\"attributes\": {\n    \"stored\": 1\n  },"));
+}
+
+TEST_F(ProjectFileForm, LeavesOutACurveThatHasNothingButAttributesThatGoWithTheSession)
+{
+    const auto project = newProject();
+    const auto track = Track::create(Track::Kind::Audio);
+    track->insertInto(*project);
+    track->curve(Envelope::Curve::Pan).setAttribute("session", Attribute{Velmark::int64{1}, false});
+
+    EXPECT_FALSE(contains(ProjectFile::toText(*project), "curves"));
 }
 
 TEST_F(ProjectFileForm, CanHaveItsMembersInAnyOrder)
@@ -569,6 +579,15 @@ TEST_F(UnstorableProject, HasAFrameRateOfZero)
     project->setFrameRate({0.0, 0});
 
     EXPECT_EQ(faultOf(project), "this project can't be stored: framesPerSecond: a number out of its bounds");
+}
+
+TEST_F(UnstorableProject, IsDropFrameAtARateThatHasNone)
+{
+    const auto project = newProject();
+    project->setFrameRate({25.0, FrameRateInfo::Flag::DropFrame});
+
+    EXPECT_EQ(faultOf(project),
+              "this project can't be stored: dropFrame: drop-frame at another rate than 30 frames per second");
 }
 
 TEST_F(UnstorableProject, HasACurveWithoutANumber)

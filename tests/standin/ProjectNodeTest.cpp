@@ -34,6 +34,7 @@ TEST(ProjectNode, AttributesHoldAnIntegerATextOrAnObject)
 {
     HostWithClip host;
     const auto list = create<IAttributeData>(host.context());
+    list->setBinary("block", "abc", 3, true);
 
     EXPECT_EQ(host.clip->setAttribute("a", FVariant::integer(-5'000'000'000), true), ResultOk);
     EXPECT_EQ(host.clip->setAttribute("b", FVariant::string("A001"), true), ResultOk);
@@ -46,7 +47,25 @@ TEST(ProjectNode, AttributesHoldAnIntegerATextOrAnObject)
     ASSERT_EQ(host.clip->getAttribute("b", value), ResultOk);
     EXPECT_STREQ(value.asString(), "A001");
     ASSERT_EQ(host.clip->getAttribute("c", value), ResultOk);
-    EXPECT_EQ(query<IAttributeData>(value.asObject()), list);
+    char bytes[4] = {};
+    ASSERT_EQ(query<IAttributeData>(value.asObject())->getBinary("block", bytes, 3), ResultOk);
+    EXPECT_STREQ(bytes, "abc");
+}
+
+TEST(ProjectNode, AnAttributeListIsCopiedWhenItIsSetAndWhenItIsGot)
+{
+    HostWithClip host;
+    const auto list = create<IAttributeData>(host.context());
+    list->setBinary("block", "abc", 3, true);
+    host.clip->setAttribute("a", FVariant::object(list.get()), true);
+    const std::string before = host.dump();
+
+    list->setBinary("block", "another", 7, true);
+    FVariant value;
+    host.clip->getAttribute("a", value);
+    query<IAttributeData>(value.asObject())->setBinary("block", "one", 3, true);
+
+    EXPECT_EQ(host.dump(), before);
 }
 
 TEST(ProjectNode, ATextThatWasSetIsTheNodesOwn)
@@ -269,6 +288,18 @@ TEST(ProjectNode, TimesOfWhatLiesInAPartCanBeAskedFromTheProjectAndFromThePart)
     EXPECT_EQ(clip->getEnd(part.get()), 30.0);
 }
 
+TEST(ProjectNode, TheTimesOfAllElseCanBeAskedFromAPartToo)
+{
+    TestHost host;
+    const auto track = host.addTrack(TypeWord::Audio, u"FX");
+    const auto part = host.addPart(track, u"storm", 100.0, 160.0);
+
+    for (IProjectNode* const node : {track.get(), host.root()}) {
+        EXPECT_EQ(node->getStart(part.get()), -100.0);
+        EXPECT_EQ(node->getEnd(part.get()), 60.0);
+    }
+}
+
 TEST(ProjectNode, WhatLiesInAPartMovesWithIt)
 {
     TestHost host;
@@ -312,6 +343,18 @@ TEST(ProjectNode, AForeignTimeContextIsRefused)
 
     EXPECT_EQ(host.clip->getStart(context), 10.0);
     EXPECT_EQ(host.clip->getEnd(context), 14.0);
+}
+
+TEST(ProjectNode, AForeignTimeContextGivesTheTimesOfTheProject)
+{
+    TestHost host;
+    const auto track = host.addTrack(TypeWord::Audio, u"FX");
+    const auto part = host.addPart(track, u"storm", 100.0, 160.0);
+    const auto clip = host.addClip(part, u"thunder", 110.0, 115.0);
+    IProjectNode* const other = &host.application.createProject();
+
+    EXPECT_EQ(clip->getStart(other), 110.0);
+    EXPECT_EQ(clip->getEnd(other), 115.0);
 }
 
 TEST(ProjectNode, AnEventAsTimeContextStandsForWhatItLiesIn)

@@ -1,5 +1,6 @@
 #include "tests/standin/RandomProject.h"
 
+#include "standin/file/ProjectKeys.h"
 #include "standin/project/AttributeList.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Envelope.h"
@@ -46,6 +47,8 @@ private:
         FrameRateInfo rate;
         rate.framesPerSecond = m_chance.oneOf(Rates);
         rate.flags = static_cast<Velmark::uint32>(m_chance.below(4));
+        if (!hasDropFrame(rate.framesPerSecond))
+            rate.flags &= ~FrameRateInfo::Flag::DropFrame;
         m_project->setFrameRate(rate);
         m_project->setTimeOrigin(3600.0 * static_cast<double>(m_chance.below(3)));
         m_project->setProjectEnd(time());

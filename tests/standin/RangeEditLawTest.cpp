@@ -5,6 +5,7 @@
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
 #include "standin/project/Track.h"
+#include "tests/standin/Heard.h"
 #include "tests/standin/RandomProject.h"
 #include "tests/standin/RangeEditHost.h"
 
@@ -73,34 +74,6 @@ Tracks someOf(Chance& chance, const Tracks& tracks)
     return some;
 }
 
-const Event& eventOf(const Node& node)
-{
-    return static_cast<const Event&>(node);
-}
-
-/// All times at which something happens on a track: starts and ends at any depth, and points. In seconds of the project.
-void collectTimes(const Container& container, std::vector<double>& times)
-{
-    for (const Node* child = container.firstChild(); child; child = container.childBehind(*child)) {
-        times.push_back(child->absoluteStart());
-        times.push_back(child->absoluteEnd());
-        collectTimes(eventOf(*child), times);
-    }
-}
-
-std::vector<double> timesOf(const Tracks& tracks)
-{
-    std::vector<double> times;
-    for (const Track* const track : tracks) {
-        collectTimes(*track, times);
-        for (const auto& [number, curve] : track->curves()) {
-            for (const Node* point = curve->firstChild(); point; point = curve->childBehind(*point))
-                times.push_back(point->start());
-        }
-    }
-    return times;
-}
-
 /// One of the times, or a round or any other one.
 double someTime(Chance& chance, const std::vector<double>& times)
 {
@@ -110,65 +83,6 @@ double someTime(Chance& chance, const std::vector<double>& times)
     const double most = 120.0;
     return kind == 1 ? static_cast<double>(chance.below(120))
                      : most * static_cast<double>(chance.below(1U << 30U)) / (1U << 30U);
-}
-
-/// Something that sounds or is shown at an instant: what it is, and how far into its media.
-using Sounding = std::tuple<const MediaClip*, std::u16string, double>;
-
-void collectSounding(const Container& container, double time, std::vector<Sounding>& sounding)
-{
-    for (const Node* child = container.firstChild(); child; child = container.childBehind(*child)) {
-        if (!(child->start() < time && time < child->end()))
-            continue;
-        if (const auto* const clip = dynamic_cast<const ClipEvent*>(child))
-            sounding.emplace_back(clip->clip(), clip->name(), clip->sourceOffset() + (time - clip->start()));
-        else if (dynamic_cast<const Marker*>(child))
-            sounding.emplace_back(nullptr, child->name(), 0.0);
-        collectSounding(eventOf(*child), time - child->start(), sounding);
-    }
-}
-
-/// All that a listener hears of a track at an instant at which no event and no point begins or ends.
-struct Heard {
-    std::vector<Sounding> sounding;
-    std::map<int32, double> values; ///< of the curves that have points
-
-    static Heard at(const Track& track, double time)
-    {
-        Heard heard;
-        collectSounding(track, time, heard.sounding);
-        std::ranges::sort(heard.sounding);
-        for (const auto& [number, curve] : track.curves()) {
-            if (const std::optional<double> value = curve->valueBehind(time))
-                heard.values[number] = *value;
-        }
-        return heard;
-    }
-
-    friend bool operator==(const Heard& a, const Heard& b)
-    {
-        const auto isNear = [](double x, double y) { return std::abs(x - y) < 1e-6; };
-        return std::ranges::equal(a.sounding, b.sounding,
-                                  [&](const Sounding& x, const Sounding& y) {
-                                      return std::get<0>(x) == std::get<0>(y) && std::get<1>(x) == std::get<1>(y) &&
-                                             isNear(std::get<2>(x), std::get<2>(y));
-                                  }) &&
-               std::ranges::equal(a.values, b.values, [&](const auto& x, const auto& y) {
-                   return x.first == y.first && isNear(x.second, y.second);
-               });
-    }
-};
-
-/// Instants between the given times, each well away from all of them.
-std::vector<double> instantsBetween(std::vector<double> times)
-{
-    std::ranges::sort(times);
-    std::vector<double> instants;
-    for (std::size_t index = 1; index < times.size(); ++index) {
-        if (times[index] - times[index - 1] > 1e-4)
-            instants.push_back((times[index - 1] + times[index]) / 2.0);
-    }
-    return instants;
 }
 
 /// Whether no event has anything in the range, and no curve a point; at the end a curve may have one.

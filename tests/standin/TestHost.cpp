@@ -110,9 +110,12 @@ TestHost::Node TestHost::curveOf(const Node& track, int32 number)
 
 MediaClip& TestHost::addMedia(const char16_t* path, double length)
 {
-    const auto clip = makeCounted<MediaClip>(MediaClip::Kind::Audio, path, length);
-    project.pool().add(clip);
-    return *clip;
+    return addToPool(makeCounted<MediaClip>(MediaClip::Kind::Audio, path, length));
+}
+
+MediaClip& TestHost::addVideo(const char16_t* path, double length)
+{
+    return addToPool(makeCounted<MediaClip>(MediaClip::Kind::Video, path, length));
 }
 
 void TestHost::edit(const char16_t* name, const std::function<void()>& edits)
@@ -130,6 +133,12 @@ std::string TestHost::dump() const
 bool TestHost::invoke(const char* action)
 {
     return service<IActionManager>(context())->invoke(IActionManager::EditCategory, action, 0) == ResultOk;
+}
+
+MediaClip& TestHost::addToPool(const Counted<MediaClip>& clip)
+{
+    project.pool().add(clip);
+    return *clip;
 }
 
 TestHost::Node TestHost::insert(IProjectNode* parent, const Node& child, const char16_t* name)

@@ -51,8 +51,9 @@ public:
     Node addPoint(const Node& track, Velmark::int32 curve, double time, float value);
     /// A curve of the track.
     Node curveOf(const Node& track, Velmark::int32 number);
-    /// A clip of the media pool.
+    /// Clips of the media pool, of sound and of picture.
     MediaClip& addMedia(const char16_t* path, double length);
+    MediaClip& addVideo(const char16_t* path, double length);
 
     /// A transaction from its begin to its commit.
     void edit(const char16_t* name, const std::function<void()>& edits);
@@ -67,6 +68,7 @@ public:
 
 private:
     bool invoke(const char* action);
+    MediaClip& addToPool(const Velmark::Counted<MediaClip>& clip);
     Node insert(Velmark::IProjectNode* parent, const Node& child, const char16_t* name);
 
     Velmark::Counted<Velmark::IEditService> m_editService;

@@ -279,6 +279,21 @@ TEST(ObjectFactory, MakesThumbnailFactoriesAndTakesThemBack)
     EXPECT_NE(objects->releaseObject(object), ResultOk) << "Not twice.";
 }
 
+TEST(ObjectFactory, TakesAnObjectBackAsAnyOfItsInterfaces)
+{
+    Application application;
+    const auto objects = service<IObjectFactory>(application.context());
+    FUnknown* const object = objects->createObject(IObjectFactory::ThumbnailClass, IObjectFactory::ThumbnailType);
+    const auto factory = query<IThumbnailFactory>(object);
+    ASSERT_NE(static_cast<void*>(factory.get()), static_cast<void*>(object));
+
+    EXPECT_EQ(objects->releaseObject(factory.get()), ResultOk);
+
+    EXPECT_EQ(factory->addRef(), 2) << "Only the reference that it gave is dropped.";
+    factory->release();
+    EXPECT_NE(objects->releaseObject(object), ResultOk) << "Not twice.";
+}
+
 TEST(ObjectFactory, MakesNothingElse)
 {
     Application application;

@@ -90,12 +90,18 @@ TEST_F(TranslationsTest, ReadsTextsToTheLetter)
                   "<text source='One&#10;two'> eins\r\nzwei </text>"
                   "<text source='Both'>bei<!-- and -->de <![CDATA[<3]]></text>"
                   "<text source='Empty'></text>"
+                  "<text source='Apart'>eins<!-- and --> <![CDATA[zwei]]></text>"
+                  "<text source='Blank'> </text>"
+                  "<text source='\uFEFFMarked'>\uFEFF</text>"
                   "</language></translations>"),
               ResultOk);
 
     EXPECT_EQ(translate(u"One\ntwo"), u" eins\nzwei ");
     EXPECT_EQ(translate(u"Both"), u"beide <3");
     EXPECT_EQ(translate(u"Empty"), u"Empty");
+    EXPECT_EQ(translate(u"Apart"), u"eins zwei");
+    EXPECT_EQ(translate(u"Blank"), u" ");
+    EXPECT_EQ(translate(u"\uFEFFMarked"), u"\uFEFF") << "A byte order mark within the table is a character.";
 }
 
 TEST_F(TranslationsTest, KeepsTheFirstTranslationAndThePointerToIt)
@@ -149,6 +155,10 @@ TEST_F(TranslationsTest, RefusesABrokenTableAsAWhole)
     EXPECT_NE(add(inLanguage(good + "<text source='A'>very <b>loud</b></text>")), ResultOk);
     EXPECT_NE(add(inLanguage(good + "<text source='A'>L\xe4uft</text>")), ResultOk) << "No UTF-8.";
     EXPECT_NE(add(inLanguage(good + "<text source='L\xe4uft'>runs</text>")), ResultOk);
+    EXPECT_NE(
+        add("<?xml version='1.0' encoding='ISO-8859-1'?>" + inLanguage(good + "<text source='A'>L\xe4uft</text>")),
+        ResultOk)
+        << "Whatever it says of itself.";
 
     EXPECT_EQ(translate(u"Preview"), u"Preview");
     EXPECT_EQ(translate(u"End"), u"Ende") << "What was read before stays.";
