@@ -44,7 +44,7 @@ public:
     /// Sets the cycle to the span of the events; arguments as of startPreview.
     virtual util::Result::Type cycleToEvents(const EventList& events, std::uint64_t first, std::uint64_t last,
                                              std::uint32_t options) = 0;
-    /// These cycles and positions are in seconds of the project's clock.
+    /// These cycles and positions are seconds from the start of the project, wherever its clock begins.
     virtual util::Result::Type getProjectCycle(double& left, double& right) = 0;
     virtual util::Result::Type setProjectCycle(double left, double right) = 0;
     virtual util::Result::Type getTransportCycle(double& left, double& right) = 0;

@@ -108,6 +108,11 @@ void Timecode::setFramerateProvider(const FramerateProvider* newProvider)
     provider = newProvider;
 }
 
+const FramerateProvider* Timecode::framerateProvider()
+{
+    return provider;
+}
+
 Framerate Timecode::framerate()
 {
     if (provider == nullptr)

@@ -42,6 +42,8 @@ public:
 
     /// Installs the source of the project's rate, or removes it with null. Not owned.
     static void setFramerateProvider(const FramerateProvider* provider);
+    /// The one that is installed; null when there is none.
+    static const FramerateProvider* framerateProvider();
     /// The provider's current rate.
     static Framerate framerate();
 

@@ -2,6 +2,7 @@
 
 #include "host/HostFailure.h"
 #include "host/Instant.h"
+#include "host/NodeReading.h"
 #include "velmark/Automation.h"
 #include "velmark/ClassId.h"
 #include "velmark/Context.h"
@@ -19,9 +20,7 @@ AutomationCurve::AutomationCurve(FUnknown* curve, double origin)
     : m_curve(required(query<IProjectNode>(curve))), m_origin(origin),
       m_number(required(query<IEnvelopeTrack>(curve))->curveNumber())
 {
-    const auto points = required(Counted<INodeIterator>::adopt(m_curve->newChildIterator()));
-    while (!points->isDone()) {
-        auto point = Counted<IProjectNode>::share(points->next());
+    for (const Counted<IProjectNode>& point : childrenOf(*m_curve)) {
         const double value = required(query<IAutomationPoint>(point))->getValue();
         m_points.push_back({point->getStart(m_curve.get()) + origin, value, point});
     }

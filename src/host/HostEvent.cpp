@@ -1,6 +1,7 @@
 #include "host/HostEvent.h"
 
 #include "host/HostFailure.h"
+#include "host/NodeReading.h"
 #include "host/Track.h"
 #include "util/HostString.h"
 #include "velmark/Attributes.h"
@@ -80,7 +81,7 @@ double HostEvent::getSourceOffset() const
 
 std::wstring HostEvent::getName() const
 {
-    return util::HostString(std::u16string_view(event().getName())).wide();
+    return nameOf(event());
 }
 
 void HostEvent::setName(IEditTransaction& /*transaction*/, const std::wstring& name)
@@ -106,7 +107,8 @@ void HostEvent::setUserId(std::int64_t id)
 
 void HostEvent::remove(IEditTransaction& transaction)
 {
-    requireOk(transaction.remove(container().get(), &event()));
+    IProjectNode& node = event();
+    requireOk(transaction.remove(container().get(), &node));
 }
 
 IProjectNode& HostEvent::event() const

@@ -36,6 +36,13 @@ inline void requireOk(Velmark::int32 result)
         throw util::Result::HostCallFailed;
 }
 
+/// Throws a result of the system's own that is none of success.
+inline void requireSuccess(util::Result::Type result)
+{
+    if (result != util::Result::Ok)
+        throw result;
+}
+
 /// The outer frame of what the host calls, which no exception may leave: carries the action out and answers what it threw,
 /// Result::NotAvailable for whatever isn't one of the system's own values.
 template <class Action>

@@ -1,6 +1,7 @@
 #include "host/MediaPool.h"
 
 #include "host/HostFailure.h"
+#include "host/NodeReading.h"
 #include "util/HostString.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
@@ -57,7 +58,7 @@ std::wstring MediaPool::getPath(std::size_t index)
 
 std::wstring MediaPool::getName(std::size_t index)
 {
-    return HostString(itemAt(index)->getName()).wide();
+    return nameOf(*itemAt(index));
 }
 
 std::wstring MediaPool::getFileName(std::size_t index)

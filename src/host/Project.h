@@ -7,45 +7,60 @@
 #include "core/FramerateProvider.h"
 #include "core/MarkerEntry.h"
 #include "host/MediaPool.h"
+#include "host/MemoSync.h"
+#include "host/ProjectListener.h"
 #include "host/Track.h"
+#include "host/TrackIndexes.h"
 #include "host/TrackRole.h"
+#include "util/ListenerSet.h"
 #include "velmark/Counted.h"
 #include "velmark/Editing.h"
+#include "velmark/Project.h"
 #include "velmark/ProjectNode.h"
+#include "velmark/Tracks.h"
 
 #include <array>
 #include <cstdint>
+#include <limits>
 #include <memory>
-#include <set>
+#include <optional>
 #include <string>
 #include <vector>
 
 namespace Velmark {
 class IHostContext;
-class IProjectDocument;
-class ITrackNode;
+class IParameter;
 } // namespace Velmark
 
 namespace cadrel::core {
 class Cut;
 class CutList;
+class EventBase;
 class ProgressHandlerBase;
 } // namespace cadrel::core
 
 namespace cadrel::host {
 
-class ProjectListener;
 class VideoProvider;
 
 /// One project of the host: it owns the model that belongs to it, finds and makes the tracks on which the system writes, and
 /// does to the host's tracks what the engine decides.
 ///
-/// Times are those of the project's clock, in seconds; what goes to the host loses the time origin on the way. Failures are
-/// thrown as Result::Type: HostObjectMissing, HostCallFailed, and NotAvailable where an operation needs the preview offset
-/// or a live track and has none.
-class Project : public core::FramerateProvider {
+/// Times are those of the project's clock, in seconds; what goes to the host loses the time origin on the way. A run writes
+/// first in the preview stretch, a whole number of days later, which no material reaches:
+///
+///     time origin                          preview offset
+///     |-- real programme --|                    |-- preview stretch --|
+///           source  |=====|  ------------------------>  |=====|  destination + offset
+///
+/// Failures are thrown as Result::Type: HostObjectMissing, HostCallFailed, and NotAvailable where an operation needs the
+/// preview offset or a live track and has none.
+class Project final : public core::FramerateProvider {
 public:
-    /// Neither is owned; the document outlives the project.
+    /// The preview offset of a project that has none.
+    static constexpr double NoPreviewOffset = std::numeric_limits<double>::lowest();
+
+    /// None of them is owned. The document outlives the project; the provider may be null.
     Project(Velmark::IHostContext* context, Velmark::IProjectDocument* document, VideoProvider* videoProvider);
     Project(const Project&) = delete;
     Project& operator=(const Project&) = delete;
@@ -56,26 +71,29 @@ public:
     core::DataModel& model() { return m_model; }
     MediaPool& mediaPool() { return m_mediaPool; }
 
-    // Storage, as attributes of the host's project.
+    // Storage, as attributes of the host's project; in ProjectStorage.cpp.
 
-    /// Reads the stored model, if there is one. Throws ChecksumMismatch and what the model's reading throws; the model
-    /// is empty then.
+    /// Reads the stored model into the fresh project, if there is one, and finds the tracks that were held locked. Throws
+    /// ChecksumMismatch and what the model's reading throws; the model is empty then.
     void load();
+    /// Replaces what is stored. A failure leaves nothing stored.
     void save();
 
-    /// The host's rate, read anew when it was marked out of date.
+    /// The host's rate, as it was when it told of changes last. Throws Result::NotSupported for a rate that isn't one.
     core::Framerate getFramerate() const override;
 
     // Tracks.
 
-    /// All tracks of the host, depth first.
-    std::vector<Velmark::ITrackNode*> allTracks();
+    /// All tracks of the host, depth first: a folder comes before what it holds.
+    std::vector<Velmark::Counted<Velmark::ITrackNode>> allTracks();
     std::vector<Track> tracksOfType(const char* word);
     /// All but folders and rulers: those that a run may change.
     std::vector<Track> cadrelTracks();
+    /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
+    /// alone, in which nobody else edits.
     void setUseTrackCache(bool flag);
     bool isTrackAlive(const Velmark::ITrackNode* track);
-    /// Counted.
+    /// The context of an object's times; null gives the root's.
     Velmark::Counted<Velmark::FUnknown> containerOf(Velmark::FUnknown* object);
 
     // Times.
@@ -83,6 +101,7 @@ public:
     double timeOrigin() const;
     double projectEnd() const;
     bool hasPreviewOffset() const;
+    /// NoPreviewOffset when there is none.
     double previewOffset() const;
     void resetPreviewOffset();
     /// Stores the first whole day past everything in the project as the offset.
@@ -92,22 +111,40 @@ public:
     /// they are.
     void setLocators(bool adjust, double left, double right);
 
-    // Work for the engine.
+    // The tracks of the system; in ProjectTracks.cpp.
 
+    /// Finds or makes the folder and the tracks of the markers that are switched on, and gives every memo a user id.
     void createMarkerTracks(Velmark::IEditTransaction& transaction);
+    /// Finds or makes the track of the new picture; does nothing without new videos.
     void createVideoTracks(Velmark::IEditTransaction& transaction);
-    void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
-    std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
-    void completeApply(Velmark::IEditTransaction& transaction);
-    /// Throws Result::InvalidArgument for an entry whose kind is none of MarkerKind; earlier ones stay written.
-    void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
-    void markVirginTerritories(Velmark::IEditTransaction& transaction, const core::CutList& cuts);
-    void clearPreview(Velmark::IEditTransaction& transaction);
-    void getApplyRange(double& start, double& end) const;
-    void closeRange(Velmark::IEditTransaction& transaction, bool onlySelected, double start, double end);
+    /// Locks or unlocks what collectLockTracks has found, the track of the new picture and the marker tracks but the
+    /// memos'. Carries out all, and throws the first failure at the end.
     void setTracksLocked(bool lock);
+    /// The tracks that a run would change and that the user hasn't locked.
     void collectLockTracks();
     void releaseLockTracks() { m_lockedTracks.clear(); }
+
+    // Work for the engine; in ProjectEdits.cpp.
+
+    /// Writes the source of the cut's events to their destination in the preview stretch.
+    void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
+    /// The tracks are those that take part in a run, and the memos'.
+    std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
+    /// Brings the preview stretch back over the real programme.
+    void completeApply(Velmark::IEditTransaction& transaction);
+    /// Writes each on the track of its kind, and none whose track isn't there. Throws Result::InvalidArgument for an entry
+    /// whose kind is none of MarkerKind; earlier ones stay written.
+    void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
+    /// Lets the automation run straight where two cuts that follow on one another don't meet. The cuts are those that
+    /// makeCut made.
+    void markVirginTerritories(Velmark::IEditTransaction& transaction, const core::CutList& cuts);
+    /// Unlocks the tracks and empties the preview stretch.
+    void clearPreview(Velmark::IEditTransaction& transaction);
+    /// What a run replaces.
+    void getApplyRange(double& start, double& end) const;
+    /// Lets the host join the pieces that the cuts have left of one clip.
+    void closeRange(Velmark::IEditTransaction& transaction, bool onlySelected, double start, double end);
+    /// Makes room for the preview; does nothing unless preview is on. With `active` only tracks that have changed count.
     void extendProjectEnd(bool active);
     core::CadrelRunState runState();
     core::CadrelPreviewState previewState();
@@ -117,27 +154,71 @@ public:
 
     // What the host tells.
 
+    /// Tells all listeners, whatever becomes of the rate. Throws what getFramerate throws.
     void onProjectChanged();
+    /// Lets the memos follow their copies in the preview.
     void onProjectEdited(Velmark::IEditTransaction& transaction);
     /// Not owned.
-    void addListener(ProjectListener* listener) { m_listeners.insert(listener); }
-    void removeListener(ProjectListener* listener) { m_listeners.erase(listener); }
+    void addListener(ProjectListener* listener) { m_listeners.add(listener); }
+    void removeListener(ProjectListener* listener) { m_listeners.remove(listener); }
 
 private:
-    std::set<ProjectListener*> m_listeners;
+    core::Framerate readFramerate() const;
+    void updateFramerate();
+    /// The seconds of a day of the clock under the project's rate.
+    double dayLength() const;
+    /// The start of the first whole day past a time.
+    double dayAfter(double seconds) const;
+    /// Throws Result::NotAvailable without one.
+    double requiredOffset() const;
+    /// The latest end of an event of these tracks that starts before a time, `earliest` at the least.
+    double latestEnd(const std::vector<Track>& tracks, double before, double earliest) const;
+    Velmark::Counted<Velmark::IProjectNode> root() const;
+    Velmark::IParameter& locator(const char* name) const;
+    void tellListeners();
+    void syncMemos(Velmark::IEditTransaction& transaction);
+
+    // Tracks of the system.
+    Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
+    bool isMarkerTrack(const Track& track) const;
+    Track newVideoTrack();
+    /// Puts a track of that role into the slot unless the one there is alive. False when there is none.
+    bool findTrack(Track& slot, const char* word, std::int32_t role);
+    void findOrCreateTrack(Velmark::IEditTransaction& transaction, Track& slot, const char* word, std::int32_t role);
+    void findOrCreateMarkerTrack(Velmark::IEditTransaction& transaction, std::int32_t role);
+    Track createTrack(const char* word);
+    /// Inserts a new track and makes it known by its role.
+    void insertTrack(Velmark::IEditTransaction& transaction, Velmark::FUnknown* parent, Track& track,
+                     std::int32_t role);
+    bool isMarkerRoleOn(std::int32_t role) const;
+
+    // Edits.
+    /// Selected, where the settings ask for selected tracks alone.
+    bool isWanted(const Track& track) const;
+    Velmark::Counted<Velmark::IObjectList> listOf(const std::vector<const Track*>& tracks) const;
+    void copyRange(const std::vector<const Track*>& tracks, double start, double end, double destination);
+    void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);
+    void moveBack(Velmark::IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end);
+    void writeDestinationMarker(Velmark::IEditTransaction& transaction, const core::EventBase& event);
+    void tick(std::uint64_t steps);
+
+    util::ListenerSet<ProjectListener> m_listeners; ///< before all tracks, which are among them
     Velmark::IProjectDocument* m_document;
     MediaPool m_mediaPool;
     VideoProvider* m_videoProvider;
-    std::vector<Track> m_markerTracks; ///< by role, less one
+    std::array<Track, TrackRole::LastMarker> m_markerTracks; ///< by role, less one
     Track m_folderTrack;
-    std::vector<Velmark::ITrackNode*> m_trackCache;
+    /// Nothing while it isn't in use, and until it's filled.
+    std::optional<std::vector<Velmark::Counted<Velmark::ITrackNode>>> m_trackCache;
     core::DataModel m_model;
     Velmark::IHostContext* m_hostContext;
-    core::Framerate m_framerate;
-    core::EventList m_previewEvents;
+    mutable core::Framerate m_framerate; ///< unknown until it's read
+    core::EventList m_previewEvents{core::ListKind::Change};
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;
+    TrackIndexes m_indexes; ///< cleared by each edit
+    MemoSync m_memoSync{*this};
 };
 
 } // namespace cadrel::host

@@ -3,6 +3,7 @@
 #include "host/AutomationCurve.h"
 #include "host/HostFailure.h"
 #include "host/Instant.h"
+#include "host/NodeReading.h"
 #include "host/Project.h"
 #include "host/TrackIndex.h"
 #include "util/HostString.h"
@@ -30,15 +31,6 @@ constexpr double HalfFrame = 0.02;
 
 /// The kinds of tracks whose events eventAt and clipEvents know.
 constexpr std::array EventKinds{TypeWord::Audio, TypeWord::Marker, TypeWord::Video};
-
-std::vector<Counted<IProjectNode>> childrenOf(IProjectNode& node)
-{
-    std::vector<Counted<IProjectNode>> children;
-    const auto iterator = required(Counted<INodeIterator>::adopt(node.newChildIterator()));
-    while (!iterator->isDone())
-        children.push_back(Counted<IProjectNode>::share(iterator->next()));
-    return children;
-}
 
 /// More than half of an event lies in a part of it, and not by a hair.
 bool isMostOf(double part, double rest)
@@ -76,6 +68,15 @@ core::SecondsRange spanOf(IProjectNode& event, FUnknown* times)
     IProjectNode* const parent = outermost->getParent();
     if (parent && parent->isType(TypeWord::Part))
         span.end += parent->getStart(times);
+    return span;
+}
+
+/// The same of an event that has to be in order.
+core::SecondsRange orderedSpanOf(IProjectNode& event, FUnknown* times)
+{
+    const core::SecondsRange span = spanOf(event, times);
+    if (span.start > span.end)
+        throw Result::InvalidArgument;
     return span;
 }
 
@@ -178,7 +179,7 @@ bool Track::hasChanged() const
 std::wstring Track::getName() const
 {
     const auto node = liveNode();
-    return node ? util::HostString(std::u16string_view(node->getName())).wide() : std::wstring();
+    return node ? nameOf(*node) : std::wstring();
 }
 
 void Track::setName(const std::wstring& name)
@@ -220,8 +221,13 @@ bool Track::hasLockState() const
 void Track::setLock(bool lock)
 {
     const auto node = requiredNode();
+    const bool wasLocked = hostLocked();
     requireOk(m_track->setFlag(TrackFlag::Lock, lock));
-    requireOk(node->setAttribute(AttributeKey::LockState, FVariant::integer(lock ? 1 : 0), true));
+    if (node->setAttribute(AttributeKey::LockState, FVariant::integer(lock ? 1 : 0), true) != ResultOk) {
+        // Nobody would know whose lock it is, and take it away.
+        m_track->setFlag(TrackFlag::Lock, wasLocked);
+        throw Result::HostCallFailed;
+    }
 }
 
 std::vector<HostEvent> Track::eventsInRange(double start, double end) const
@@ -279,10 +285,7 @@ core::SecondsRange Track::eventSpan(const HostEvent& event) const
 {
     if (!event)
         throw Result::NotAvailable;
-    const core::SecondsRange span = spanOf(*event.node(), container().get());
-    if (span.start > span.end)
-        throw Result::InvalidArgument;
-    return span;
+    return orderedSpanOf(*event.node(), container().get());
 }
 
 void Track::assignIds(double start, double end)
@@ -311,14 +314,17 @@ void Track::removeEvent(IEditTransaction& transaction, HostEvent& event)
 
 void Track::removeRange(IEditTransaction& transaction, double start, double end)
 {
-    std::vector<Counted<IProjectNode>> children = childrenOf(*requiredNode());
+    const auto node = requiredNode();
     if (start > end)
         throw Result::InvalidArgument;
-    const double origin = timeOrigin();
+    const double from = start - timeOrigin();
+    const double to = end - timeOrigin();
+    const auto times = container();
+    std::vector<Counted<IProjectNode>> children = childrenOf(*node);
     std::erase_if(children, [&](const Counted<IProjectNode>& child) {
-        const core::SecondsRange span = eventSpan(HostEvent(*this, child));
-        const bool startsInRange = !isBefore(span.start, start - origin) && isBefore(span.start, end - origin);
-        return !startsInRange || isBefore(end - origin, span.end);
+        const core::SecondsRange span = orderedSpanOf(*child, times.get());
+        const bool liesInRange = !isBefore(span.start, from) && isBefore(span.start, to) && !isBefore(to, span.end);
+        return !liesInRange;
     });
     removeChildren(transaction, children);
 }

@@ -17,6 +17,11 @@ public:
     explicit AlteredContext(Velmark::IHostContext* host) : m_host(host) {}
 
     void hide(const Velmark::Identifier& id) { m_altered.push_back({id, nullptr}); }
+    /// The host's own again.
+    void unhide(const Velmark::Identifier& id)
+    {
+        std::erase_if(m_altered, [&](const auto& altered) { return altered.first == id; });
+    }
     /// What is given instead has to answer to the identifier.
     void replace(const Velmark::Identifier& id, Velmark::Counted<Velmark::FObject> object)
     {

@@ -1,0 +1,23 @@
+#pragma once
+
+#include "core/FramerateProvider.h"
+#include "core/Timecode.h"
+
+namespace cadrel::host {
+
+/// While it lives, timecodes have the rate of a project; behind it that of whoever gave it before.
+class FramerateScope {
+public:
+    explicit FramerateScope(const core::FramerateProvider& provider) : m_former(core::Timecode::framerateProvider())
+    {
+        core::Timecode::setFramerateProvider(&provider);
+    }
+    FramerateScope(const FramerateScope&) = delete;
+    FramerateScope& operator=(const FramerateScope&) = delete;
+    ~FramerateScope() { core::Timecode::setFramerateProvider(m_former); }
+
+private:
+    const core::FramerateProvider* m_former;
+};
+
+} // namespace cadrel::host

@@ -1,0 +1,245 @@
+#include "host/Host.h"
+
+#include "core/ChangeContext.h"
+#include "core/DataModel.h"
+#include "core/DataModelCommandCreator.h"
+#include "core/Timecode.h"
+#include "host/AlertWindow.h"
+#include "host/FileBrowserDialog.h"
+#include "host/FirstFailure.h"
+#include "host/FramerateScope.h"
+#include "host/HostFailure.h"
+#include "host/Project.h"
+#include "host/VideoProvider.h"
+#include "util/StringUtil.h"
+
+#include <algorithm>
+#include <utility>
+
+using namespace Velmark;
+using cadrel::util::Result;
+
+namespace cadrel::host {
+
+namespace {
+
+std::wstring loadingAlert(Result::Type failure)
+{
+    switch (failure) {
+    case Result::UnknownVersion:
+        return L"The project was created with an unsupported Cadrel version. The data cannot be loaded.";
+    case Result::NewerVersion:
+        return L"The project was created with a newer Cadrel version. The data cannot be loaded.";
+    default:
+        return L"An error occurred while loading the Cadrel data. The data will be ignored.";
+    }
+}
+
+} // namespace
+
+Host::Host(FUnknown* context)
+    : m_context(required(query<IHostContext>(context))),
+      m_projectManager(required(service<IProjectManager>(m_context))),
+      m_serviceContext(required(query<IHostContext>(context))), m_transport(service<ITransportControl>(m_context)),
+      m_translator(std::make_shared<StringTranslator>(m_context.get())),
+      m_videoProvider(std::make_shared<VideoProvider>(m_context.get()))
+{
+    registerWithHost();
+    for (int32 index = 0; index < m_projectManager->projectCount(); ++index) {
+        if (IProjectDocument* const project = m_projectManager->projectAt(index))
+            projectOpened(project);
+    }
+    if (IProjectDocument* const active = m_projectManager->activeProject())
+        projectActivated(active);
+}
+
+Host::~Host()
+{
+    m_registration.run();
+}
+
+void Host::registerWithHost()
+{
+    requireOk(m_projectManager->addNotification(this));
+    m_registration.add([this] { m_projectManager->removeNotification(this); });
+    AlertWindow::install(m_context.get());
+    m_registration.add([] { AlertWindow::uninstall(); });
+    FileBrowserDialog::install(m_context.get());
+    m_registration.add([] { FileBrowserDialog::uninstall(); });
+    util::StringUtil::setConverter(m_translator.get());
+    core::setDataModelCommandCreator(this);
+    m_registration.add([] {
+        core::setDataModelCommandCreator(nullptr);
+        util::StringUtil::setConverter(nullptr);
+    });
+    m_registration.add([this] {
+        while (!m_projects.empty())
+            projectClosing(m_projects.begin()->first, 0);
+    });
+    // Last, so that at the end there are no idle calls any more before the projects go.
+    const auto idleManager = required(service<IIdleManager>(m_context));
+    requireOk(idleManager->addIdleHandler(this));
+    m_registration.add([this, idleManager] { idleManager->removeIdleHandler(this); });
+}
+
+core::DataModel* Host::getProjectModel()
+{
+    return m_currentProject ? &m_currentProject->model() : nullptr;
+}
+
+std::optional<Host::Document> Host::activeDocument()
+{
+    if (!m_currentProject)
+        return std::nullopt;
+    return Document{m_currentProject->model(), m_currentProject->document()};
+}
+
+int32 Host::projectOpened(IProjectDocument* project)
+{
+    const Result::Type result = resultOf([&] { open(project); });
+    if (result != Result::Ok)
+        showAlert(loadingAlert(result));
+    return result;
+}
+
+void Host::open(IProjectDocument* document)
+{
+    if (find(required(document)))
+        return;
+    const auto dependencies = required(service<IDependencyManager>(m_context));
+    OpenProject entry;
+    requireOk(document->addStorageNotification(this));
+    entry.registration.add([this, document] { document->removeStorageNotification(this); });
+    requireOk(dependencies->addDependent(document, this));
+    entry.registration.add([this, document, dependencies] { dependencies->removeDependent(document, this); });
+    entry.project = std::make_unique<Project>(m_context.get(), document, m_videoProvider.get());
+    Project& project = *entry.project;
+    m_projects.emplace(document, std::move(entry));
+    // A project whose data can't be read stays, with an empty model.
+    project.load();
+}
+
+int32 Host::projectActivated(IProjectDocument* project)
+{
+    return resultOf([&] { setCurrentProject(find(project)); });
+}
+
+int32 Host::projectDeactivated(IProjectDocument* /*project*/)
+{
+    return resultOf([&] { setCurrentProject(nullptr); });
+}
+
+void Host::setCurrentProject(Project* project)
+{
+    // Nothing is left behind half: the window follows whatever fails.
+    FirstFailure failure;
+    if (m_currentProject != project)
+        clearRequests();
+    if (m_currentProject)
+        m_currentProject->model().setNotifier(nullptr);
+    m_currentProject = project;
+    core::Timecode::setFramerateProvider(project);
+    if (project) {
+        project->model().setNotifier(this);
+        failure.ofStep([&] { project->model().notifyPreviewState(); });
+    }
+    failure.ofStep([&] { m_videoProvider->setProject(project); });
+    failure.ofStep([&] { notify(core::DataModelChangeContext(getProjectModel())); });
+    failure.raise();
+}
+
+void Host::clearRequests()
+{
+    m_runRequested = false;
+    m_previewRequested = false;
+    m_restorePreviewState = false;
+}
+
+int32 Host::projectClosing(IProjectDocument* project, int32 /*reserved*/)
+{
+    return resultOf([&] { close(project); });
+}
+
+void Host::close(IProjectDocument* document)
+{
+    const auto found = m_projects.find(document);
+    if (found == m_projects.end())
+        throw Result::HostObjectMissing;
+    found->second.registration.run();
+    if (found->second.project.get() == m_currentProject)
+        projectDeactivated(document);
+    m_projects.erase(found);
+}
+
+int32 Host::projectRenamed(IProjectDocument* /*project*/)
+{
+    return ResultOk;
+}
+
+int32 Host::projectStoring(IProjectDocument* project)
+{
+    const Result::Type result = resultOf([&] { required(find(project))->save(); });
+    if (result != Result::Ok)
+        showAlert(L"An error occurred while saving the Cadrel data.");
+    return result;
+}
+
+int32 Host::update(FUnknown* changed, int32 /*message*/)
+{
+    if (m_processing)
+        return ResultOk;
+    return resultOf([&] {
+        const auto document = query<IProjectDocument>(changed);
+        Project* const project = find(document.get());
+        if (!project)
+            return;
+        const FramerateScope rate(*project);
+        project->onProjectChanged();
+        if (project == m_currentProject && std::exchange(m_modelReplaced, false))
+            unlockAfterUndo(*project);
+    });
+}
+
+void Host::notify(const core::ChangeContext& context)
+{
+    if (context.type == core::ChangeContext::DataModelChanged)
+        m_modelReplaced = true;
+    ChangeContextNotificationBase::notify(context);
+}
+
+/// Takes the locks of a preview that is no longer, since nothing else would.
+void Host::unlockAfterUndo(Project& project)
+{
+    if (project.model().isPreviewActive())
+        return;
+    const std::vector<Track> tracks = project.cadrelTracks();
+    if (std::ranges::none_of(tracks, [](const Track& track) { return track.hasLockState(); }))
+        return;
+    project.setTracksLocked(false);
+    project.releaseLockTracks();
+}
+
+int32 Host::projectEdited(IProjectDocument* project, IEditTransaction* transaction)
+{
+    if (m_processing || !m_currentProject || project != m_currentProject->document())
+        return ResultOk;
+    const Result::Type result = resultOf([&] {
+        const FramerateScope rate(*m_currentProject);
+        m_currentProject->onProjectEdited(*required(transaction));
+    });
+    return result == Result::Ok ? result : Result::HostObjectMissing;
+}
+
+Project* Host::find(IProjectDocument* document) const
+{
+    const auto found = m_projects.find(document);
+    return found != m_projects.end() ? found->second.project.get() : nullptr;
+}
+
+void Host::showAlert(const std::wstring& message)
+{
+    // It is the last step of a failure, and doesn't fail itself.
+    resultOf([&] { AlertWindow::instance().show(message, L"", L"", L""); });
+}
+
+} // namespace cadrel::host

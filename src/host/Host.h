@@ -1,0 +1,203 @@
+#pragma once
+
+#include "core/CadrelerBase.h"
+#include "core/ChangeContextNotificationBase.h"
+#include "core/EventList.h"
+#include "core/serialize/ByteArchive.h"
+#include "host/DataModelCommandCreator.h"
+#include "host/StringTranslator.h"
+#include "host/Teardown.h"
+#include "host/Transport.h"
+#include "velmark/Context.h"
+#include "velmark/Counted.h"
+#include "velmark/Editing.h"
+#include "velmark/Implements.h"
+#include "velmark/Module.h"
+#include "velmark/Project.h"
+
+#include <cstdint>
+#include <functional>
+#include <map>
+#include <memory>
+#include <optional>
+#include <string>
+
+namespace cadrel::host {
+
+class Project;
+class VideoProvider;
+
+/// The one object through which the engine and the window reach the host. It keeps a Project for each project that is open
+/// there, follows which one is active, and carries out what the engine asks for on that one.
+///
+/// A run or a preview is only requested by the window and done on a later idle call, as one entry of the host's undo list:
+///
+///     startCadrel()     raises a flag
+///     onIdle()          progress > transaction > model command > run > commit under "Apply Cadrel"
+///
+/// While such a transaction is open, what the host tells of edits is ignored. A run that fails keeps what it has done, under
+/// "Apply Cadrel (incomplete)"; one that the user cancels is undone.
+///
+/// Cycles, locators and positions are seconds from the time origin, as the host has them; all other times are seconds of
+/// the project's clock. What is asked without an active project does nothing and answers Result::Ok, an empty result or
+/// what the operation says. What the host refuses is thrown as HostFailure.h tells.
+class Host : public Velmark::Implements<Host, Velmark::FObject, Velmark::IProjectNotification,
+                                        Velmark::IProjectStorageNotification, Velmark::IProjectEditHook,
+                                        Velmark::IIdleHandler>,
+             public core::ChangeContextNotificationBase,
+             public core::CadrelerBase,
+             public DataModelCommandCreator {
+public:
+    static constexpr const char* ClassName = "Host";
+
+    /// `context` is an IHostContext. Becomes the alerts, file boxes, string converter and command creator of the process,
+    /// and catches up with the projects that are open. Throws Result::HostObjectMissing when the host has no context, no
+    /// project manager or no idle calls, and Result::NotAvailable when the process has alerts or file boxes already;
+    /// nothing stays registered then.
+    explicit Host(Velmark::FUnknown* context);
+    Host(const Host&) = delete;
+    Host& operator=(const Host&) = delete;
+    ~Host() override;
+
+    /// The active project's; null without one.
+    core::DataModel* getProjectModel();
+    const std::shared_ptr<VideoProvider>& getVideoProvider() const { return m_videoProvider; }
+
+    // What the host tells.
+
+    Velmark::int32 update(Velmark::FUnknown* changed, Velmark::int32 message) override;
+    Velmark::int32 projectActivated(Velmark::IProjectDocument* project) override;
+    Velmark::int32 projectDeactivated(Velmark::IProjectDocument* project) override;
+    Velmark::int32 projectOpened(Velmark::IProjectDocument* project) override;
+    Velmark::int32 projectClosing(Velmark::IProjectDocument* project, Velmark::int32 reserved) override;
+    Velmark::int32 projectRenamed(Velmark::IProjectDocument* project) override;
+    Velmark::int32 projectStoring(Velmark::IProjectDocument* project) override;
+    Velmark::int32 projectEdited(Velmark::IProjectDocument* project, Velmark::IEditTransaction* transaction) override;
+    Velmark::int32 onIdle() override;
+
+    /// A model that an undo has brought back may want the tracks unlocked; see update().
+    void notify(const core::ChangeContext& context) override;
+
+    // What the window calls.
+
+    util::Result::Type startCadrel() override;
+    util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
+                                    std::uint32_t options) override;
+    /// Result::NoProject without a project; Result::InvalidArgument when there are no events besides the neighbours or none
+    /// of them has valid times.
+    util::Result::Type cycleToEvents(const core::EventList& events, std::uint64_t first, std::uint64_t last,
+                                     std::uint32_t options) override;
+    util::Result::Type getProjectCycle(double& left, double& right) override;
+    util::Result::Type setProjectCycle(double left, double right) override;
+    util::Result::Type getTransportCycle(double& left, double& right) override;
+    util::Result::Type setTransportCycle(double left, double right) override;
+    util::Result::Type getTransportPosition(double& seconds) override;
+    util::Result::Type setTransportPosition(double seconds) override;
+    util::Result::Type endPreview() override;
+    std::wstring getProjectName() override;
+    core::MediaPoolInterface* getMediaPool() override;
+    double getTimeOrigin() override;
+    /// Carries out all that belongs to it, and throws the first failure at the end.
+    void setPreviewActive(bool active) override;
+    bool isPreviewActive() override;
+
+    // The steps of a run. Those that edit throw Result::NotAvailable when no transaction is open.
+
+    util::Result::Type canStart() override;
+    util::Result::Type removeVirginTerritoryMarkers() override;
+    util::Result::Type processEvent(core::Cut& cut) override;
+    std::shared_ptr<core::Cut> makeCutEvents(const std::shared_ptr<core::EventBase>& changeEvent) override;
+    util::Result::Type completeCadrel() override;
+    util::Result::Type generateMarkers(const std::vector<core::MarkerEntry>& entries) override;
+    core::CadrelRunState getRunState() override;
+    core::CadrelPreviewState getPreviewState() override;
+    util::Result::Type applyVirginTerritories(core::CutList& cuts) override;
+    util::Result::Type setProjectEvents(const core::EventList& events) override;
+    /// The number of tracks is the project's own, not the one given.
+    std::uint64_t estimateSteps(std::uint64_t eventCount, const core::Settings& settings,
+                                std::uint64_t trackCount) override;
+
+protected:
+    std::optional<Document> activeDocument() override;
+    Velmark::IHostContext* serviceContext() override { return m_serviceContext.get(); }
+
+private:
+    struct OpenProject {
+        Teardown registration; ///< with the host
+        std::unique_ptr<Project> project;
+    };
+    /// The names of an entry of the undo list, not translated.
+    struct EntryName {
+        const char16_t* done;
+        const char16_t* incomplete;
+    };
+    /// What the user sees of a run or preview while it goes on.
+    struct Appearance {
+        const wchar_t* title; ///< not translated
+        bool canCancel;
+    };
+    class LoweredPreviewFlag;
+
+    static const EntryName Apply;
+    static const EntryName Preview;
+    static const EntryName EndPreview;
+    static const EntryName DeletePreviewRange;
+
+    // Projects, in Host.cpp.
+    void registerWithHost();
+    void open(Velmark::IProjectDocument* document);
+    void close(Velmark::IProjectDocument* document);
+    /// Null for what isn't registered.
+    Project* find(Velmark::IProjectDocument* document) const;
+    void setCurrentProject(Project* project);
+    void clearRequests();
+    void unlockAfterUndo(Project& project);
+    static void showAlert(const std::wstring& message);
+
+    // Runs and previews, in HostRuns.cpp.
+    util::Result::Type runCadrel();
+    util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
+                                  std::uint32_t options);
+    util::Result::Type finishPreview(const EntryName& name);
+    /// The frame of a run or preview of so many events around its transaction.
+    util::Result::Type withProgress(const Appearance& appearance, std::size_t eventCount,
+                                    const std::function<void()>& work);
+    /// Carries out steps as one entry of the undo list. What they throw is the result, and the name of the entry says so.
+    util::Result::Type edit(const EntryName& name, const std::function<void(Velmark::IEditTransaction&)>& steps);
+    void commit(const char16_t* name);
+    void takeBack();
+    void restoreCycles();
+    void keepCycles();
+    void joinPieces(Velmark::IEditTransaction& transaction, double start, double end);
+    /// Where a run may begin: makes sure that there is a preview offset before canStart is asked.
+    util::Result::Type prepareStart();
+    static void ensurePreviewOffset(Project& project);
+    /// The one that is open.
+    Velmark::IEditTransaction& openTransaction() const;
+    void announce(const wchar_t* text);
+
+    Velmark::Counted<Velmark::IHostContext> m_context;
+    Velmark::Counted<Velmark::IProjectManager> m_projectManager;
+    std::map<Velmark::IProjectDocument*, OpenProject> m_projects;
+    Project* m_currentProject = nullptr; ///< not owned
+    /// The one that still has to be committed; nothing outside of a run, a preview or the end of one.
+    Velmark::Counted<Velmark::IEditTransaction> m_transaction;
+    Velmark::Counted<Velmark::IHostContext> m_serviceContext;
+    Transport m_transport;
+    std::shared_ptr<StringTranslator> m_translator;
+    std::shared_ptr<VideoProvider> m_videoProvider;
+    bool m_processing = false; ///< from the begin of a transaction to the end of its commit
+    bool m_runRequested = false;
+    bool m_previewRequested = false;
+    core::EventList m_previewEvents{core::ListKind::Change};
+    std::uint64_t m_previewFirst = 0;
+    std::uint64_t m_previewLast = 0;
+    std::uint32_t m_previewOptions = 0;
+    core::serialize::ByteArchive m_modelSnapshot; ///< of the moment of the preview request
+    /// The preview has just been switched on: what is undone goes back to when it was off.
+    bool m_restorePreviewState = false;
+    bool m_modelReplaced = false; ///< since the last update()
+    Teardown m_registration;
+};
+
+} // namespace cadrel::host

@@ -1,0 +1,193 @@
+// What the engine asks for, carried out on the active project.
+
+#include "core/Cut.h"
+#include "core/CutList.h"
+#include "core/DataModel.h"
+#include "core/ProgressHandlerBase.h"
+#include "host/Host.h"
+#include "host/HostFailure.h"
+#include "host/Project.h"
+#include "util/HostString.h"
+#include "util/StringUtil.h"
+#include "velmark/Media.h"
+
+#include <algorithm>
+#include <array>
+
+using namespace Velmark;
+using cadrel::util::Result;
+
+namespace cadrel::host {
+
+Result::Type Host::getProjectCycle(double& left, double& right)
+{
+    if (m_currentProject)
+        m_currentProject->getLocators(left, right);
+    return Result::Ok;
+}
+
+Result::Type Host::setProjectCycle(double left, double right)
+{
+    if (m_currentProject)
+        m_currentProject->setLocators(false, left, right);
+    return Result::Ok;
+}
+
+Result::Type Host::getTransportCycle(double& left, double& right)
+{
+    if (m_currentProject)
+        m_transport.getCycle(left, right);
+    return Result::Ok;
+}
+
+Result::Type Host::setTransportCycle(double left, double right)
+{
+    if (m_currentProject)
+        m_transport.setCycle(left, right);
+    return Result::Ok;
+}
+
+Result::Type Host::getTransportPosition(double& seconds)
+{
+    if (m_currentProject)
+        seconds = m_transport.position();
+    return Result::Ok;
+}
+
+Result::Type Host::setTransportPosition(double seconds)
+{
+    if (m_currentProject)
+        m_transport.setPosition(seconds);
+    return Result::Ok;
+}
+
+std::wstring Host::getProjectName()
+{
+    if (!m_currentProject)
+        return {};
+    IProjectDocument* const document = m_currentProject->document();
+    const auto file = Counted<IFilePath>::adopt(document->getProjectFile(document));
+    if (!file)
+        return {};
+    std::array<char16_t, IFilePath::Capacity> path{};
+    requireOk(file->getPath(path.data()));
+    return util::HostString(path.data()).wide();
+}
+
+core::MediaPoolInterface* Host::getMediaPool()
+{
+    return m_currentProject ? &m_currentProject->mediaPool() : nullptr;
+}
+
+double Host::getTimeOrigin()
+{
+    return m_currentProject ? m_currentProject->timeOrigin() : 0.0;
+}
+
+bool Host::isPreviewActive()
+{
+    return m_currentProject && m_currentProject->model().isPreviewActive();
+}
+
+Result::Type Host::removeVirginTerritoryMarkers()
+{
+    if (!m_currentProject)
+        return Result::NoProject;
+    // What is no longer in the preview stretch isn't followed any more either.
+    m_currentProject->previewEvents().clear();
+    m_currentProject->clearPreview(openTransaction());
+    return Result::Ok;
+}
+
+Result::Type Host::processEvent(core::Cut& cut)
+{
+    if (!m_currentProject)
+        return Result::NoProject;
+    if (m_progress && m_progress->isCancelled())
+        return Result::Cancelled;
+    m_currentProject->processCut(openTransaction(), cut);
+    return Result::Ok;
+}
+
+std::shared_ptr<core::Cut> Host::makeCutEvents(const std::shared_ptr<core::EventBase>& changeEvent)
+{
+    if (!m_currentProject)
+        return std::make_shared<core::Cut>(changeEvent, core::Cut::CutEvents());
+    return m_currentProject->makeCut(changeEvent);
+}
+
+Result::Type Host::completeCadrel()
+{
+    if (!m_currentProject)
+        return Result::Ok;
+    announce(L"Completing");
+    m_currentProject->completeApply(openTransaction());
+    return Result::Ok;
+}
+
+Result::Type Host::generateMarkers(const std::vector<core::MarkerEntry>& entries)
+{
+    if (!m_currentProject)
+        return Result::Ok;
+    announce(L"Generate Markers");
+    if (m_progress)
+        m_progress->beginStage(entries.size());
+    m_currentProject->generateMarkers(openTransaction(), entries);
+    return Result::Ok;
+}
+
+core::CadrelRunState Host::getRunState()
+{
+    return m_currentProject ? m_currentProject->runState() : core::CadrelRunState();
+}
+
+core::CadrelPreviewState Host::getPreviewState()
+{
+    return m_currentProject ? m_currentProject->previewState() : core::CadrelPreviewState();
+}
+
+Result::Type Host::applyVirginTerritories(core::CutList& cuts)
+{
+    const Result::Type result = CadrelerBase::applyVirginTerritories(cuts);
+    if (result != Result::Ok || !m_currentProject || !m_currentProject->model().settings().createVirginTerritories())
+        return result;
+    announce(L"Virgin Territories");
+    m_currentProject->markVirginTerritories(openTransaction(), cuts);
+    return Result::Ok;
+}
+
+Result::Type Host::setProjectEvents(const core::EventList& events)
+{
+    if (m_currentProject)
+        m_currentProject->previewEvents().copyFrom(events);
+    return Result::Ok;
+}
+
+std::uint64_t Host::estimateSteps(std::uint64_t eventCount, const core::Settings& settings,
+                                  std::uint64_t /*trackCount*/)
+{
+    if (!m_currentProject)
+        return 0;
+    const std::vector<Track> candidates = m_currentProject->cadrelTracks();
+    const bool onlySelected = settings.applyTo() == core::ApplyTo::SelectedTracks;
+    const auto tracks = static_cast<std::uint64_t>(
+        std::ranges::count_if(candidates, [&](const Track& track) { return !onlySelected || track.isSelected(); }));
+    const std::uint64_t ofCuts = ((m_runRequested ? 1 : 0) + eventCount) * tracks;
+    const std::uint64_t ofTerritories = settings.createVirginTerritories() ? ofCuts : 0;
+    return CadrelerBase::estimateSteps(eventCount, settings, tracks) + ofCuts + ofTerritories;
+}
+
+IEditTransaction& Host::openTransaction() const
+{
+    if (!m_transaction)
+        throw Result::NotAvailable;
+    return *m_transaction;
+}
+
+void Host::announce(const wchar_t* text)
+{
+    if (m_progress)
+        m_progress->setText(util::StringUtil::translate(text));
+}
+
+} // namespace cadrel::host

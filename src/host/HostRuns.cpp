@@ -1,0 +1,411 @@
+// Runs and previews: how a request becomes one entry of the host's undo list.
+
+#include "core/ChangeContext.h"
+#include "core/DataModel.h"
+#include "core/EventBase.h"
+#include "host/DataModelEditStep.h"
+#include "host/FirstFailure.h"
+#include "host/Host.h"
+#include "host/HostFailure.h"
+#include "host/PreviewEventsStep.h"
+#include "host/ProgressHandler.h"
+#include "host/Project.h"
+#include "host/VideoProvider.h"
+#include "util/StringUtil.h"
+#include "velmark/UserInterface.h"
+
+#include <algorithm>
+#include <limits>
+#include <utility>
+
+using namespace Velmark;
+using cadrel::util::Result;
+
+namespace cadrel::host {
+
+namespace {
+
+/// Of the ActionChangeContext.
+enum Action : std::int32_t { PreviewAction = 0, RunAction = 1 };
+
+bool isOnlySelected(const core::Settings& settings)
+{
+    return settings.applyTo() == core::ApplyTo::SelectedTracks;
+}
+
+std::vector<Track> runTracks(Project& project)
+{
+    std::vector<Track> tracks = project.cadrelTracks();
+    if (isOnlySelected(project.model().settings()))
+        std::erase_if(tracks, [](const Track& track) { return !track.isSelected(); });
+    return tracks;
+}
+
+} // namespace
+
+const Host::EntryName Host::Apply{u"Apply Cadrel", u"Apply Cadrel (incomplete)"};
+const Host::EntryName Host::Preview{u"Preview", u"Preview (incomplete)"};
+const Host::EntryName Host::EndPreview{u"End Preview", u"End Preview (incomplete)"};
+const Host::EntryName Host::DeletePreviewRange{u"Delete Preview Range", u"Delete Preview Range (incomplete)"};
+
+/// While it lives, the preview flag of a model is down.
+class Host::LoweredPreviewFlag {
+public:
+    explicit LoweredPreviewFlag(core::DataModel& model) : m_model(model), m_wasActive(model.isPreviewActive())
+    {
+        m_model.setPreviewActive(false);
+    }
+    LoweredPreviewFlag(const LoweredPreviewFlag&) = delete;
+    LoweredPreviewFlag& operator=(const LoweredPreviewFlag&) = delete;
+    ~LoweredPreviewFlag() { m_model.setPreviewActive(m_wasActive); }
+
+private:
+    core::DataModel& m_model;
+    bool m_wasActive;
+};
+
+int32 Host::onIdle()
+{
+    resultOf([this] { m_videoProvider->poll(); });
+    // A progress window that lets idle calls through doesn't begin a second run within the first.
+    if (m_progress)
+        return ResultOk;
+    if (m_runRequested) {
+        runCadrel();
+        m_runRequested = false;
+        resultOf([this] { notify(core::ActionChangeContext(RunAction)); });
+    }
+    if (m_previewRequested) {
+        runPreview(m_previewEvents, m_previewFirst, m_previewLast, m_previewOptions);
+        m_previewRequested = false;
+        resultOf([this] { notify(core::ActionChangeContext(PreviewAction)); });
+    }
+    return ResultOk;
+}
+
+Result::Type Host::startCadrel()
+{
+    const Result::Type result = prepareStart();
+    if (result == Result::Ok)
+        m_runRequested = true;
+    return result;
+}
+
+Result::Type Host::startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
+                                std::uint32_t options)
+{
+    const Result::Type result = prepareStart();
+    if (result != Result::Ok)
+        return result;
+    m_previewEvents.copyFrom(events);
+    m_previewFirst = first;
+    m_previewLast = last;
+    m_previewOptions = options;
+    core::DataModel& model = m_currentProject->model();
+    std::optional<LoweredPreviewFlag> lowered;
+    if (std::exchange(m_restorePreviewState, false))
+        lowered.emplace(model);
+    m_modelSnapshot = DataModelEditStep::snapshotOf(model);
+    m_previewRequested = true;
+    return Result::Ok;
+}
+
+Result::Type Host::prepareStart()
+{
+    const Result::Type result = resultOf([this] {
+        if (m_currentProject)
+            ensurePreviewOffset(*m_currentProject);
+    });
+    return result == Result::Ok ? canStart() : result;
+}
+
+void Host::ensurePreviewOffset(Project& project)
+{
+    if (!project.hasPreviewOffset())
+        project.computePreviewOffset();
+}
+
+Result::Type Host::canStart()
+{
+    if (!m_currentProject)
+        return Result::NoProject;
+    core::DataModel& model = m_currentProject->model();
+    if (model.changeEdl().isEmpty())
+        return Result::ChangeEdlEmpty;
+    if (m_currentProject->cadrelTracks().empty())
+        return Result::NoTracks;
+    return runTracks(*m_currentProject).empty() ? Result::NoTracksSelected : Result::Ok;
+}
+
+Result::Type Host::runCadrel()
+{
+    if (!m_currentProject)
+        return Result::NoProject;
+    Project& project = *m_currentProject;
+    const core::EventList& changeList = project.model().changeEdl();
+    return withProgress({L"Processing Project", true}, changeList.size(), [&] {
+        bool isCancelled = false;
+        const Result::Type result = edit(Apply, [&](IEditTransaction& transaction) {
+            core::EditTransactionHandle handle(transaction);
+            const auto command = createCommand(handle);
+            project.createMarkerTracks(transaction);
+            const Result::Type ran = run(changeList);
+            isCancelled = ran == Result::Cancelled;
+            if (isCancelled)
+                return;
+            requireSuccess(ran);
+            project.createVideoTracks(transaction);
+            m_videoProvider->apply(true, transaction, 0.0);
+            double start = 0.0;
+            double end = 0.0;
+            project.getApplyRange(start, end);
+            joinPieces(transaction, start, end);
+        });
+        if (isCancelled)
+            takeBack();
+        requireSuccess(result);
+    });
+}
+
+Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
+                              std::uint32_t options)
+{
+    if (!m_currentProject)
+        return Result::NoProject;
+    Project& project = *m_currentProject;
+    return withProgress({L"Project Preview", false}, events.size(), [&] {
+        requireSuccess(edit(Preview, [&](IEditTransaction& transaction) {
+            core::EditTransactionHandle handle(transaction);
+            const auto command = createCommand(handle, m_modelSnapshot);
+            project.createVideoTracks(transaction);
+            project.createMarkerTracks(transaction);
+            requireSuccess(CadrelerBase::startPreview(events, first, last, options));
+            const double offset = project.previewOffset();
+            m_videoProvider->apply(true, transaction, offset);
+            // Without material in the preview the project ends before it.
+            joinPieces(transaction, offset, std::max(offset, project.projectEnd()));
+            project.previewEvents().copyFrom(events);
+        }));
+        project.collectLockTracks();
+        requireSuccess(cycleToEvents(events, first, last, options));
+    });
+}
+
+Result::Type Host::finishPreview(const EntryName& name)
+{
+    if (!m_currentProject)
+        return Result::Ok;
+    Project& project = *m_currentProject;
+    if (!project.hasPreviewOffset()) {
+        project.previewEvents().clear();
+        return Result::Ok;
+    }
+    return edit(name, [&](IEditTransaction& transaction) {
+        project.previewEvents().clear();
+        core::EditTransactionHandle handle(transaction);
+        const auto command = createCommand(handle);
+        m_videoProvider->apply(false, transaction, project.previewOffset());
+        requireSuccess(CadrelerBase::endPreview());
+        project.resetPreviewOffset();
+    });
+}
+
+Result::Type Host::withProgress(const Appearance& appearance, std::size_t eventCount, const std::function<void()>& work)
+{
+    Project& project = *m_currentProject;
+    ProgressHandler progress(m_serviceContext.get());
+    const auto idleManager = service<IIdleManager>(m_serviceContext);
+    bool isBlocked = false;
+    const Result::Type result = resultOf([&] {
+        project.setUseTrackCache(true);
+        ensurePreviewOffset(project);
+        m_transport.stop();
+        m_progress = &progress;
+        project.setProgress(&progress);
+        isBlocked = idleManager && idleManager->setIdleBlocked(true) == ResultOk;
+        progress.start(util::StringUtil::translate(appearance.title),
+                       estimateSteps(eventCount, project.model().settings(), 0), appearance.canCancel);
+        work();
+    });
+    // Not there when it couldn't be started.
+    resultOf([&] { progress.finish(); });
+    if (isBlocked)
+        idleManager->setIdleBlocked(false);
+    m_progress = nullptr;
+    project.setProgress(nullptr);
+    project.setUseTrackCache(false);
+    return result;
+}
+
+Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTransaction&)>& steps)
+{
+    core::EventList& previewed = m_currentProject->previewEvents();
+    const PreviewEventsStep::Events previewedBefore = previewed.events();
+    const auto keepPreviewed = [&](IEditTransaction& transaction) {
+        if (previewed.events() != previewedBefore)
+            transaction.addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get());
+    };
+    m_processing = true;
+    const Result::Type result = resultOf([&] {
+        auto transaction = required(query<IEditTransaction>(required(service<IEditService>(m_serviceContext))));
+        requireOk(transaction->begin(true));
+        m_transaction = std::move(transaction);
+        steps(*m_transaction);
+        keepPreviewed(*m_transaction);
+        commit(name.done);
+    });
+    if (m_transaction) {
+        resultOf([&] {
+            keepPreviewed(*m_transaction);
+            commit(name.incomplete);
+        });
+        m_transaction.reset();
+    }
+    m_processing = false;
+    return result;
+}
+
+void Host::commit(const char16_t* name)
+{
+    requireOk(m_transaction->commit(m_currentProject->document(), m_translator->translate(name)));
+    m_transaction.reset();
+}
+
+/// Undoes the run that the user has cancelled.
+void Host::takeBack()
+{
+    // The undo removes tracks that it holds.
+    m_currentProject->setUseTrackCache(false);
+    const auto actions = required(service<IActionManager>(m_context));
+    requireOk(actions->invoke(IActionManager::EditCategory, IActionManager::Undo, 0));
+}
+
+/// Joins what a run has split and put together again.
+void Host::joinPieces(IEditTransaction& transaction, double start, double end)
+{
+    m_currentProject->closeRange(transaction, isOnlySelected(m_currentProject->model().settings()), start, end);
+}
+
+Result::Type Host::endPreview()
+{
+    m_runRequested = false;
+    m_previewRequested = false;
+    std::optional<LoweredPreviewFlag> lowered;
+    if (m_currentProject && m_restorePreviewState)
+        lowered.emplace(m_currentProject->model());
+    return finishPreview(DeletePreviewRange);
+}
+
+void Host::setPreviewActive(bool active)
+{
+    if (!m_currentProject)
+        return;
+    Project& project = *m_currentProject;
+    core::DataModel& model = project.model();
+    const bool wasActive = model.isPreviewActive();
+    FirstFailure failure;
+    if (!active)
+        clearRequests();
+    if (wasActive && !active) {
+        failure.ofStep([&] { restoreCycles(); });
+        failure.ofStep([&] { requireSuccess(finishPreview(EndPreview)); });
+    }
+    if (!wasActive && active)
+        m_restorePreviewState = true;
+    model.setPreviewActive(active);
+    failure.ofStep([&] { model.notifyPreviewState(); });
+    if (!active) {
+        failure.ofStep([&] { project.setTracksLocked(false); });
+        project.releaseLockTracks();
+    } else {
+        // What is kept is how it stood before the preview moved it.
+        if (!wasActive)
+            failure.ofStep([&] { keepCycles(); });
+        failure.ofStep([&] { ensurePreviewOffset(project); });
+    }
+    failure.ofStep([&] { project.extendProjectEnd(active); });
+    failure.raise();
+}
+
+void Host::keepCycles()
+{
+    using Key = core::PropertyKey;
+    core::DataModel& model = m_currentProject->model();
+    double left = 0.0;
+    double right = 0.0;
+    getProjectCycle(left, right);
+    model.setProperty(Key::ProjectCycleLeft, core::Variant(left));
+    model.setProperty(Key::ProjectCycleRight, core::Variant(right));
+    getTransportCycle(left, right);
+    model.setProperty(Key::TransportCycleLower, core::Variant(std::min(left, right)));
+    model.setProperty(Key::TransportCycleUpper, core::Variant(std::max(left, right)));
+    double position = 0.0;
+    getTransportPosition(position);
+    model.setProperty(Key::TransportPosition, core::Variant(position));
+}
+
+void Host::restoreCycles()
+{
+    using Key = core::PropertyKey;
+    const core::DataModel& model = m_currentProject->model();
+    const auto kept = [&](std::int32_t key) -> std::optional<double> {
+        core::Variant value;
+        if (model.getProperty(key, value) != Result::Ok)
+            return std::nullopt;
+        return value.toDouble();
+    };
+    FirstFailure failure;
+    const auto lower = kept(Key::TransportCycleLower);
+    const auto upper = kept(Key::TransportCycleUpper);
+    if (lower && upper)
+        failure.ofStep([&] { setTransportCycle(*lower, *upper); });
+    if (const auto position = kept(Key::TransportPosition))
+        failure.ofStep([&] { setTransportPosition(*position); });
+    const auto left = kept(Key::ProjectCycleLeft);
+    const auto right = kept(Key::ProjectCycleRight);
+    if (left && right)
+        failure.ofStep([&] { setProjectCycle(*left, *right); });
+    failure.raise();
+}
+
+Result::Type Host::cycleToEvents(const core::EventList& events, std::uint64_t first, std::uint64_t last,
+                                 std::uint32_t options)
+{
+    if (events.isEmpty())
+        return Result::Ok;
+    if (first > events.size() || last > events.size() - first)
+        return Result::InvalidArgument;
+    if (!m_currentProject)
+        return Result::NoProject;
+    Project& project = *m_currentProject;
+    const bool isAtDestination = options != 0;
+    if (isAtDestination && !project.hasPreviewOffset())
+        return Result::NotAvailable;
+
+    double oldLeft = 0.0;
+    double oldRight = 0.0;
+    project.getLocators(oldLeft, oldRight);
+    const core::Framerate rate = project.getFramerate();
+    double start = std::numeric_limits<double>::max();
+    double end = std::numeric_limits<double>::min();
+    for (std::size_t index = first; index < events.size() - last; ++index) {
+        const core::EventBase& event = events.at(index);
+        if (event.hasFlaw(core::EventFlaw::TimecodeInvalid))
+            continue;
+        start = std::min(start, (isAtDestination ? event.dstIn() : event.srcIn()).toSeconds(rate));
+        end = std::max(end, (isAtDestination ? event.dstOut() : event.srcOut()).toSeconds(rate));
+    }
+    if (isAtDestination) {
+        start += project.previewOffset();
+        end += project.previewOffset();
+    }
+    const double origin = project.timeOrigin();
+    setTransportCycle(start - origin, end - origin);
+    setTransportPosition(start - origin);
+    project.setLocators(true, start, start + oldRight - oldLeft);
+    project.setTracksLocked(isAtDestination);
+    project.model().setProperty(core::PropertyKey::PreviewAtDestination, core::Variant(isAtDestination));
+    return Result::Ok;
+}
+
+} // namespace cadrel::host

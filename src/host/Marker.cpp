@@ -1,0 +1,41 @@
+#include "host/Marker.h"
+
+#include "host/HostEvent.h"
+#include "host/HostFailure.h"
+#include "host/Instant.h"
+#include "host/Track.h"
+#include "velmark/Attributes.h"
+#include "velmark/ClassId.h"
+#include "velmark/Context.h"
+
+#include <cmath>
+
+using namespace Velmark;
+
+namespace cadrel::host {
+
+namespace {
+
+/// In seconds.
+constexpr double LongestPoint = 0.01;
+
+} // namespace
+
+void Marker::insertInto(IHostContext* context, IEditTransaction& transaction, const Track& track) const
+{
+    if (!track.isAlive())
+        throw util::Result::NotAvailable;
+    const bool isRange = isBefore(LongestPoint, std::abs(end - start));
+    HostEvent marker(track,
+                     required(create<IProjectNode>(context, isRange ? ClassId::RangeMarker : ClassId::PointMarker)));
+    marker.setStart(transaction, start);
+    if (isRange)
+        marker.setEnd(transaction, end);
+    requireOk(transaction.insert(track.container().get(), marker.node()));
+    marker.setName(transaction, name);
+    requireOk(marker.node()->setAttribute(AttributeKey::Reel, FVariant::string(reel.c_str()), true));
+    if (userId != 0)
+        marker.setUserId(userId);
+}
+
+} // namespace cadrel::host

@@ -1,0 +1,229 @@
+#include "host/MemoSync.h"
+
+#include "core/EventBase.h"
+#include "core/EventList.h"
+#include "host/Instant.h"
+#include "host/Marker.h"
+#include "host/Project.h"
+#include "host/Track.h"
+
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
+using cadrel::core::SecondsRange;
+using Velmark::IEditTransaction;
+
+namespace cadrel::host {
+
+namespace {
+
+bool isEmpty(const SecondsRange& range)
+{
+    return !isBefore(range.start, range.end);
+}
+
+/// What a later event has left of ranges on which it was written.
+std::vector<SecondsRange> without(const std::vector<SecondsRange>& ranges, const SecondsRange& written)
+{
+    std::vector<SecondsRange> left;
+    for (const SecondsRange& range : ranges) {
+        for (const SecondsRange& piece : {SecondsRange{range.start, std::min(range.end, written.start)},
+                                          SecondsRange{std::max(range.start, written.end), range.end}}) {
+            if (!isEmpty(piece))
+                left.push_back(piece);
+        }
+    }
+    return left;
+}
+
+bool hasId(const std::vector<HostEvent>& memos, std::int64_t id)
+{
+    return std::ranges::any_of(memos, [id](const HostEvent& memo) { return memo.getUserId() == id; });
+}
+
+/// Takes the memo of that id out of the list; an empty handle when there is none.
+HostEvent takeById(std::vector<HostEvent>& memos, std::int64_t id)
+{
+    const auto found = std::ranges::find_if(memos, [id](const HostEvent& memo) { return memo.getUserId() == id; });
+    if (found == memos.end())
+        return {};
+    const HostEvent memo = *found;
+    memos.erase(found);
+    return memo;
+}
+
+} // namespace
+
+double MemoSync::Stretch::clamped(double sourceTime) const
+{
+    return std::clamp(sourceTime, source.start, source.end);
+}
+
+double MemoSync::Stretch::toSource(double previewTime) const
+{
+    return clamped(previewTime - preview.start + source.start);
+}
+
+//     event i           preview  |=================|
+//     event i + 1                         |=============|      written later
+//     stretch of i      preview  |========|
+//                       source   |========|--------|
+std::vector<MemoSync::Stretch> MemoSync::stretchesOf(const Project& project, const Events& events, std::size_t index)
+{
+    const core::Framerate framerate = project.getFramerate();
+    const double offset = project.previewOffset();
+    const auto isWritten = [](const core::EventBase& event) {
+        return !event.hasFlaw(core::EventFlaw::TimecodeInvalid) && event.srcIn() < event.srcOut() &&
+               event.dstIn() < event.dstOut();
+    };
+    const auto previewOf = [&](const core::EventBase& event) {
+        return SecondsRange{event.dstIn().toSeconds(framerate) + offset, event.dstOut().toSeconds(framerate) + offset};
+    };
+
+    const core::EventBase& event = *events[index];
+    if (!isWritten(event))
+        return {};
+    const SecondsRange whole = previewOf(event);
+    std::vector<SecondsRange> pieces{whole};
+    for (std::size_t later = index + 1; later < events.size(); ++later) {
+        if (isWritten(*events[later]))
+            pieces = without(pieces, previewOf(*events[later]));
+    }
+
+    const double srcIn = event.srcIn().toSeconds(framerate);
+    const double srcOut = event.srcOut().toSeconds(framerate);
+    std::vector<Stretch> stretches;
+    for (const SecondsRange& piece : pieces) {
+        const SecondsRange source{srcIn + (piece.start - whole.start),
+                                  std::min(srcIn + (piece.end - whole.start), srcOut)};
+        if (!isEmpty(source))
+            stretches.push_back({source, piece});
+    }
+    return stretches;
+}
+
+std::vector<HostEvent> MemoSync::memosIn(const Track& memos, const SecondsRange& range) const
+{
+    const double origin = m_project.timeOrigin();
+    std::vector<HostEvent> found = memos.eventsInRange(range.start - origin, range.end - origin);
+    // A range doesn't hold its end, and what is copied doesn't either.
+    std::erase_if(found, [&range](const HostEvent& memo) { return !isBefore(memo.getStart(), range.end); });
+    return found;
+}
+
+MemoSync::Memos MemoSync::stateOf(const Track& memos, const std::vector<Stretch>& stretches) const
+{
+    Memos state;
+    for (const Stretch& stretch : stretches) {
+        for (const HostEvent& copy : memosIn(memos, stretch.preview))
+            state.push_back({copy.getUserId(), copy.getName(), copy.getStart(), copy.getEnd()});
+    }
+    return state;
+}
+
+void MemoSync::remember(const Track& memos)
+{
+    const Events& events = m_project.previewEvents().events();
+    std::erase_if(m_remembered,
+                  [&events](const auto& entry) { return std::ranges::find(events, entry.first) == events.end(); });
+    for (std::size_t index = 0; index < events.size(); ++index) {
+        if (!m_remembered.contains(events[index]))
+            m_remembered.emplace(events[index], stateOf(memos, stretchesOf(m_project, events, index)));
+    }
+}
+
+void MemoSync::follow(const Track& memos, IEditTransaction& transaction)
+{
+    const Events& events = m_project.previewEvents().events();
+    for (std::size_t index = 0; index < events.size(); ++index) {
+        const std::vector<Stretch> stretches = stretchesOf(m_project, events, index);
+        const auto remembered = m_remembered.find(events[index]);
+        const bool isKnown = remembered != m_remembered.end();
+        // Where two events show the same source, only the one whose copy was edited is to be followed.
+        if (isKnown && remembered->second == stateOf(memos, stretches))
+            continue;
+        for (const Stretch& stretch : stretches)
+            followStretch(memos, transaction, stretch, isKnown ? &remembered->second : nullptr);
+    }
+    m_remembered.clear();
+    remember(memos);
+}
+
+void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, const Stretch& stretch,
+                             const Memos* remembered)
+{
+    std::vector<HostEvent> copies = memosIn(memos, stretch.preview);
+    std::vector<HostEvent> sources = sourceMemos(memos, stretch, copies, remembered);
+    const std::size_t copyCount = copies.size();
+    const std::size_t sourceCount = sources.size();
+
+    std::erase_if(copies, [&](const HostEvent& copy) {
+        HostEvent memo = takeById(sources, copy.getUserId());
+        if (memo)
+            carryOver(transaction, copy, memo, stretch);
+        return static_cast<bool>(memo);
+    });
+    // What is left has no partner.
+    if (sourceCount > copyCount) {
+        for (HostEvent& memo : sources)
+            memo.remove(transaction);
+    }
+    if (copyCount > sourceCount) {
+        for (HostEvent& copy : copies) {
+            copy.setUserId(memos.nextUserId());
+            Marker{stretch.toSource(copy.getStart()),
+                   stretch.toSource(copy.getEnd()),
+                   copy.getName(),
+                   {},
+                   copy.getUserId()}
+                .insertInto(m_project.hostContext(), transaction, memos);
+        }
+    }
+}
+
+std::vector<HostEvent> MemoSync::sourceMemos(const Track& memos, const Stretch& stretch,
+                                             const std::vector<HostEvent>& copies, const Memos* remembered) const
+{
+    std::vector<HostEvent> found = memosIn(memos, stretch.source);
+    // What the user has written there since belongs to the real programme alone.
+    if (remembered) {
+        std::erase_if(found, [&](const HostEvent& memo) {
+            const std::int64_t id = memo.getUserId();
+            return !hasId(copies, id) && std::ranges::find(*remembered, id, &Memo::id) == remembered->end();
+        });
+    }
+    // A memo that only reaches into the stretch has its copy there, too.
+    for (HostEvent& memo : memos.clipEvents()) {
+        const bool reachesIn =
+            isBefore(memo.getStart(), stretch.source.end) && isBefore(stretch.source.start, memo.getEnd());
+        const std::int64_t id = memo.getUserId();
+        if (reachesIn && hasId(copies, id) && !hasId(found, id))
+            found.push_back(std::move(memo));
+    }
+    return found;
+}
+
+void MemoSync::carryOver(IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo, const Stretch& stretch)
+{
+    const std::wstring name = copy.getName();
+    if (memo.getName() != name)
+        memo.setName(transaction, name);
+
+    // What hangs over an edge of the stretch isn't in the preview, and stays.
+    const auto followed = [&stretch](double own, double inPreview) {
+        const double mapped = stretch.toSource(inPreview);
+        return std::abs(stretch.clamped(own) - mapped) < core::SameInstant ? own : mapped;
+    };
+    const double ownStart = memo.getStart();
+    const double ownEnd = memo.getEnd();
+    const double start = followed(ownStart, copy.getStart());
+    const double end = followed(ownEnd, copy.getEnd());
+    if (start != ownStart || (memo.isRange() && end != ownEnd)) {
+        memo.setStart(transaction, start);
+        if (memo.isRange())
+            memo.setLength(transaction, end - start);
+    }
+}
+
+} // namespace cadrel::host

@@ -1,0 +1,74 @@
+#pragma once
+
+#include "core/SecondsRange.h"
+#include "host/HostEvent.h"
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace Velmark {
+class IEditTransaction;
+} // namespace Velmark
+
+namespace cadrel::core {
+class EventBase;
+} // namespace cadrel::core
+
+namespace cadrel::host {
+
+class Project;
+class Track;
+
+/// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
+/// copy have the same user id.
+class MemoSync {
+public:
+    explicit MemoSync(Project& project) : m_project(project) {}
+
+    /// Carries over what differs, for each previewed event whose stretch isn't as it was remembered. Needs the preview
+    /// offset. Throws Result::HostObjectMissing and Result::HostCallFailed.
+    void follow(const Track& memos, Velmark::IEditTransaction& transaction);
+    /// Notes the stretches of the events that are previewed since the last time. What is edited in the real programme
+    /// stays as it is until the copies are edited, too.
+    void remember(const Track& memos);
+
+private:
+    /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's
+    /// clock.
+    struct Stretch {
+        core::SecondsRange source;
+        core::SecondsRange preview;
+
+        double clamped(double sourceTime) const;
+        double toSource(double previewTime) const;
+    };
+    struct Memo {
+        std::int64_t id;
+        std::wstring name;
+        double start;
+        double end;
+
+        bool operator==(const Memo&) const = default;
+    };
+    using Memos = std::vector<Memo>;
+    using Events = std::vector<std::shared_ptr<core::EventBase>>;
+
+    static std::vector<Stretch> stretchesOf(const Project& project, const Events& events, std::size_t index);
+    std::vector<HostEvent> memosIn(const Track& memos, const core::SecondsRange& range) const;
+    /// What stands in the preview stretches of an event.
+    Memos stateOf(const Track& memos, const std::vector<Stretch>& stretches) const;
+    void followStretch(const Track& memos, Velmark::IEditTransaction& transaction, const Stretch& stretch,
+                       const Memos* remembered);
+    std::vector<HostEvent> sourceMemos(const Track& memos, const Stretch& stretch, const std::vector<HostEvent>& copies,
+                                       const Memos* remembered) const;
+    static void carryOver(Velmark::IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo,
+                          const Stretch& stretch);
+
+    Project& m_project;
+    std::map<std::shared_ptr<core::EventBase>, Memos> m_remembered;
+};
+
+} // namespace cadrel::host

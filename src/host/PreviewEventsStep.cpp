@@ -1,0 +1,17 @@
+#include "host/PreviewEventsStep.h"
+
+#include "host/HostFailure.h"
+
+#include <utility>
+
+namespace cadrel::host {
+
+Velmark::int32 PreviewEventsStep::swap()
+{
+    return resultOf([this] {
+        Events present = m_list.release();
+        m_list.append(std::exchange(m_other, std::move(present)));
+    });
+}
+
+} // namespace cadrel::host

@@ -1,0 +1,742 @@
+// A preview from its request to its end, and what the user does meanwhile.
+
+#include "core/ChangeContext.h"
+#include "host/Host.h"
+#include "host/Project.h"
+#include "host/TrackRole.h"
+#include "tests/core/RecordingListener.h"
+#include "tests/core/ThrownResult.h"
+#include "tests/host/AdaptedHost.h"
+#include "tests/host/WatchedProgress.h"
+#include "velmark/Attributes.h"
+#include "velmark/Tracks.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <functional>
+#include <initializer_list>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace cadrel::host::tests {
+namespace {
+
+using namespace Velmark;
+using cadrel::tests::RecordingListener;
+using cadrel::tests::thrownBy;
+using core::ChangeContext;
+using core::PropertyKey;
+using util::Result;
+
+using Texts = std::vector<std::string>;
+using Entries = AdaptedHost::Entries;
+using Node = AdaptedHost::Node;
+using Span = std::pair<double, double>;
+
+/// The first whole day behind the film, in seconds of the clock.
+constexpr double Day = 86400.0;
+
+/// A film of two clips of ten seconds that change places, previewed.
+class HostPreviewTest : public AtEachOrigin {
+protected:
+    HostPreviewTest()
+    {
+        host.addSound(track, u"one", 0.0, 10.0);
+        host.addSound(track, u"two", 10.0, 20.0);
+        host.switchMarkersOff();
+        host.carryOver("01:00:00:00", "01:00:10:00", "01:00:10:00", "01:00:20:00");
+        host.carryOver("01:00:10:00", "01:00:20:00", "01:00:00:00", "01:00:10:00");
+        host.project.locatorLeft().setValue(0, 3.0);
+        host.project.locatorRight().setValue(0, 8.0);
+        host.project.cycleLeft().setValue(0, 4.0);
+        host.project.cycleRight().setValue(0, 9.0);
+        host.project.position().setValue(0, 5.0);
+        entriesBefore = host.undoNames();
+    }
+
+    Host& adapter() { return host.adapter(); }
+    core::EventList& changes() { return host.model().changeEdl(); }
+    core::EventList firstChange()
+    {
+        core::EventList list;
+        list.append(changes(), 0, 1);
+        return list;
+    }
+    core::EventList secondChange()
+    {
+        core::EventList list;
+        list.append(changes(), 1, 1);
+        return list;
+    }
+    /// As the window does it.
+    void previewAll()
+    {
+        adapter().setPreviewActive(true);
+        host.preview(changes());
+    }
+
+    Entries entriesBeforeAnd(std::initializer_list<std::u16string> names) const
+    {
+        Entries entries = entriesBefore;
+        entries.insert(entries.end(), names);
+        return entries;
+    }
+    bool isLocked(const Node& node) { return query<ITrackNode>(node)->getFlag(TrackFlag::Lock) == ResultOk; }
+    Span transportCycle() { return {host.project.cycleLeft().getValue(), host.project.cycleRight().getValue()}; }
+    Span locators() { return {host.project.locatorLeft().getValue(), host.project.locatorRight().getValue()}; }
+    bool hasOffset()
+    {
+        core::Variant offset(Project::NoPreviewOffset);
+        host.model().getProperty(PropertyKey::PreviewOffset, offset);
+        return offset.toDouble() > Project::NoPreviewOffset;
+    }
+
+    AdaptedHost host{GetParam()};
+    Node track = host.addTrack(TypeWord::Audio, u"DX");
+    Entries entriesBefore;
+};
+
+INSTANTIATE_TEST_SUITE_P(Origins, HostPreviewTest, testing::Values(0.0, 3600.0));
+
+/// A preview of a film with memos, in which the user works on them.
+class HostMemoTest : public HostPreviewTest {
+protected:
+    HostMemoTest()
+    {
+        memos = host.addTrack(TypeWord::Marker, u"Memos");
+        memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
+        host.addRangeMarker(memos, u"hiss", host.inHost(2.0), host.inHost(4.0));
+        host.addPointMarker(memos, u"click", host.inHost(6.0));
+        host.addPointMarker(memos, u"far", host.inHost(30.0));
+    }
+
+    /// The memos of the film, without those of the preview.
+    Texts filmMemos()
+    {
+        Texts content = host.contentOf(memos);
+        std::erase_if(content, [&](const std::string& memo) { return isOfPreview(memo); });
+        return content;
+    }
+    /// The memo in the preview, of that name.
+    Node copyOf(std::u16string_view name)
+    {
+        for (const Node& child : standin::tests::childrenOf(*memos)) {
+            if (name == child->getName() && child->getStart(nullptr) > host.inHost(1000.0))
+                return child;
+        }
+        ADD_FAILURE() << "There is no such copy.";
+        return nullptr;
+    }
+    void edit(const std::function<void()>& edits) { host.edit(u"Edit", edits); }
+    /// A time of the film, in the preview, as the host counts it.
+    double inPreview(double filmSeconds) { return Day + host.inHost(filmSeconds); }
+
+    Node memos;
+
+private:
+    static bool isOfPreview(const std::string& memo)
+    {
+        const std::size_t blank = memo.rfind(' ');
+        return std::stod(memo.substr(blank + 1)) > 1000.0;
+    }
+};
+
+INSTANTIATE_TEST_SUITE_P(Origins, HostMemoTest, testing::Values(0.0, 3600.0));
+
+} // namespace
+
+TEST_P(HostPreviewTest, WritesTheNewProgrammeBehindAllMaterial)
+{
+    previewAll();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview"}));
+    EXPECT_FALSE(host.isEditOpen());
+}
+
+TEST_P(HostPreviewTest, WritesTheChosenEventsAlone)
+{
+    adapter().setPreviewActive(true);
+
+    host.preview(firstChange());
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewTest, WritesTheEventsAsTheyWereWhenItWasRequested)
+{
+    adapter().setPreviewActive(true);
+    ASSERT_EQ(adapter().startPreview(changes(), 0, 0, 1), Result::Ok);
+    changes().at(0).setDst(core::Timecode("01:00:30:00"), core::Timecode("01:00:40:00"));
+
+    host.idle();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewTest, ReplacesThePreviewBefore)
+{
+    previewAll();
+
+    host.preview(secondChange());
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410"}));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"Preview"}));
+}
+
+TEST_P(HostPreviewTest, ShowsNothingForNoEvents)
+{
+    previewAll();
+
+    host.preview(core::EventList());
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_EQ(host.undoNames().back(), u"Preview");
+}
+
+TEST_P(HostPreviewTest, IsTakenBackWholeByAnUndo)
+{
+    const std::string before = host.dump();
+    previewAll();
+    const Texts after = host.contentOf(track);
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_FALSE(adapter().isPreviewActive()) << "It was off before the preview.";
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_FALSE(host.trackNamed(u"Cadrel Markers"));
+
+    ASSERT_TRUE(host.redo());
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_EQ(host.contentOf(track), after);
+}
+
+TEST_P(HostPreviewTest, LeavesThePreviewOnWhenALaterOneIsUndone)
+{
+    previewAll();
+    host.preview(secondChange());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewTest, TellsThatItHasEnded)
+{
+    RecordingListener heard;
+    adapter().addListener(&heard);
+
+    previewAll();
+
+    adapter().removeListener(&heard);
+    EXPECT_EQ(heard.types,
+              (std::vector<std::int32_t>{ChangeContext::PreviewStateChanged, ChangeContext::ActionFinished}));
+}
+
+TEST_P(HostPreviewTest, ShowsItsProgressWithoutAWayToCancel)
+{
+    const auto progress = makeCounted<WatchedProgress>();
+    host.altered.replace(IProgressService::iid, progress);
+
+    previewAll();
+
+    EXPECT_FALSE(progress->canCancel());
+    EXPECT_EQ(std::ranges::count(progress->calls, "Project Preview"), 1);
+    // Two events on one track.
+    EXPECT_EQ(std::ranges::count(progress->calls, "setRange 2"), 1);
+    EXPECT_EQ(std::ranges::count(progress->calls, "Project Preview - Generate Markers"), 1);
+    EXPECT_EQ(std::ranges::count(progress->calls, "Project Preview - Completing"), 0);
+}
+
+TEST_P(HostPreviewTest, WritesTheNewPictureInThePreview)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:05:00"), core::Timecode("00:00:04:00")),
+        false);
+
+    previewAll();
+
+    const Node video = host.trackNamed(u"New Video");
+    ASSERT_TRUE(video);
+    const auto events = standin::tests::childrenOf(*video);
+    ASSERT_EQ(events.size(), 1U);
+    EXPECT_DOUBLE_EQ(events[0]->getStart(nullptr), Day + host.inHost(5.0));
+}
+
+TEST_P(HostPreviewTest, MovesToItsEvents)
+{
+    adapter().setPreviewActive(true);
+
+    host.preview(changes(), 0, 1);
+
+    // The second is a neighbour. The locators keep their distance of 5 s and start a tenth of it before.
+    const double start = Day + host.inHost(10.0);
+    EXPECT_EQ(transportCycle(), Span(start, Day + host.inHost(20.0)));
+    EXPECT_EQ(host.project.position().getValue(), start);
+    EXPECT_DOUBLE_EQ(locators().first, start - 0.5);
+    EXPECT_DOUBLE_EQ(locators().second, start + 4.5);
+}
+
+TEST_P(HostPreviewTest, MovesToWhereItsEventsComeFrom)
+{
+    adapter().setPreviewActive(true);
+
+    host.preview(changes(), 0, 1, false);
+
+    EXPECT_EQ(transportCycle(), Span(host.inHost(0.0), host.inHost(10.0)));
+    EXPECT_FALSE(isLocked(track));
+}
+
+TEST_P(HostPreviewTest, LocksTheTracksThatItShows)
+{
+    const Node own = host.addTrack(TypeWord::Audio, u"Own");
+    query<ITrackNode>(own)->setFlag(TrackFlag::Lock, true);
+    host.settings().setCreateOverlapMarkers(true);
+
+    previewAll();
+
+    EXPECT_TRUE(isLocked(track));
+    EXPECT_TRUE(isLocked(host.trackNamed(u"Overlap")));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Memos"))) << "The user goes on to write there.";
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Overlap")));
+    EXPECT_TRUE(isLocked(own)) << "That is the user's lock.";
+}
+
+TEST_P(HostPreviewTest, ConformsUnderItsOwnLocks)
+{
+    previewAll();
+    ASSERT_TRUE(isLocked(track));
+
+    host.preview(secondChange());
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410"}));
+    EXPECT_TRUE(isLocked(track));
+}
+
+// Failures.
+
+TEST_P(HostPreviewTest, KeepsWhatItHasDoneWhenItFails)
+{
+    adapter().setPreviewActive(true);
+    ASSERT_EQ(adapter().startPreview(changes(), 0, 0, 1), Result::Ok);
+    const Texts before = host.contentOf(track);
+    host.altered.hide(ClassId::ObjectList);
+
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview (incomplete)"}));
+    EXPECT_FALSE(host.isEditOpen());
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.contentOf(track), before);
+    EXPECT_FALSE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, KeepsWhatItHasDoneWhenItsEndFails)
+{
+    previewAll();
+    // A progress or a list isn't wanted at the end, but the edit service is.
+    host.altered.hide(IEditService::iid);
+
+    EXPECT_EQ(thrownBy([&] { adapter().setPreviewActive(false); }), Result::HostObjectMissing);
+
+    EXPECT_FALSE(adapter().isPreviewActive());
+    EXPECT_FALSE(isLocked(track)) << "All else is carried out.";
+    EXPECT_EQ(transportCycle(), Span(4.0, 9.0));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview"}));
+}
+
+TEST_P(HostPreviewTest, EndsAllTheSameWhereTheTransportIsGone)
+{
+    previewAll();
+    host.model().setProperty(PropertyKey::TransportCycleLower, core::Variant(9.0));
+    host.model().setProperty(PropertyKey::TransportCycleUpper, core::Variant(4.0));
+
+    EXPECT_EQ(thrownBy([&] { adapter().setPreviewActive(false); }), Result::InvalidArgument);
+
+    EXPECT_EQ(host.project.position().getValue(), 5.0);
+    EXPECT_EQ(locators(), Span(3.0, 8.0));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"End Preview"}));
+    EXPECT_FALSE(adapter().isPreviewActive());
+}
+
+// The switch.
+
+TEST_P(HostPreviewTest, KeepsHowEverythingStoodBefore)
+{
+    adapter().setPreviewActive(true);
+
+    const auto kept = [&](std::int32_t key) {
+        core::Variant value;
+        EXPECT_EQ(host.model().getProperty(key, value), Result::Ok);
+        EXPECT_EQ(value.valueType(), core::Variant::Double);
+        return value.toDouble();
+    };
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_EQ(kept(PropertyKey::ProjectCycleLeft), 3.0);
+    EXPECT_EQ(kept(PropertyKey::ProjectCycleRight), 8.0);
+    EXPECT_EQ(kept(PropertyKey::TransportCycleLower), 4.0);
+    EXPECT_EQ(kept(PropertyKey::TransportCycleUpper), 9.0);
+    EXPECT_EQ(kept(PropertyKey::TransportPosition), 5.0);
+    EXPECT_EQ(kept(PropertyKey::PreviewOffset), Day);
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+}
+
+TEST_P(HostPreviewTest, KeepsACycleThatIsTurnedRound)
+{
+    host.project.cycleLeft().setValue(0, 9.0);
+    host.project.cycleRight().setValue(0, 4.0);
+
+    adapter().setPreviewActive(true);
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(transportCycle(), Span(4.0, 9.0));
+}
+
+TEST_P(HostPreviewTest, KeepsThemOnceWhenItIsSwitchedOnTwice)
+{
+    previewAll();
+
+    adapter().setPreviewActive(true);
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(locators(), Span(3.0, 8.0));
+    EXPECT_EQ(transportCycle(), Span(4.0, 9.0));
+}
+
+TEST_P(HostPreviewTest, LeavesTheUsersTracksAsTheyWereWhenItEnds)
+{
+    previewAll();
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_EQ(locators(), Span(3.0, 8.0));
+    EXPECT_EQ(transportCycle(), Span(4.0, 9.0));
+    EXPECT_EQ(host.project.position().getValue(), 5.0);
+    EXPECT_FALSE(adapter().isPreviewActive());
+    EXPECT_FALSE(hasOffset());
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"End Preview"}));
+}
+
+TEST_P(HostPreviewTest, ComesBackWhenItsEndIsUndone)
+{
+    previewAll();
+    const Texts during = host.contentOf(track);
+    adapter().setPreviewActive(false);
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_TRUE(hasOffset());
+    EXPECT_EQ(host.contentOf(track), during);
+
+    ASSERT_TRUE(host.redo());
+    EXPECT_FALSE(adapter().isPreviewActive());
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+}
+
+TEST_P(HostPreviewTest, TellsThatItIsSwitched)
+{
+    RecordingListener heard;
+    adapter().addListener(&heard);
+
+    adapter().setPreviewActive(true);
+    EXPECT_EQ(heard.types, std::vector<std::int32_t>{ChangeContext::PreviewStateChanged});
+    adapter().setPreviewActive(false);
+
+    adapter().removeListener(&heard);
+    EXPECT_EQ(std::ranges::count(heard.types, ChangeContext::PreviewStateChanged), 2);
+}
+
+TEST_P(HostPreviewTest, MakesRoomForThePreview)
+{
+    adapter().setPreviewActive(true);
+
+    // A day from the offset on: nothing has changed, so that the preview is as long as the first.
+    EXPECT_DOUBLE_EQ(host.root()->getEnd(nullptr), 2.0 * Day - host.origin);
+}
+
+TEST_P(HostPreviewTest, EndsWhereNothingWasKept)
+{
+    host.model().setPreviewActive(true);
+
+    EXPECT_NO_THROW(adapter().setPreviewActive(false));
+
+    EXPECT_FALSE(adapter().isPreviewActive());
+    EXPECT_EQ(locators(), Span(3.0, 8.0));
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+}
+
+TEST_P(HostPreviewTest, RestoresEachOfTheValuesThatWasKept)
+{
+    previewAll();
+    host.model().removeProperty(PropertyKey::TransportCycleUpper);
+    host.model().removeProperty(PropertyKey::ProjectCycleLeft);
+    const Span cycle = transportCycle();
+    const Span left = locators();
+
+    EXPECT_NO_THROW(adapter().setPreviewActive(false));
+
+    EXPECT_EQ(transportCycle(), cycle) << "Half a cycle is none.";
+    EXPECT_EQ(locators(), left);
+    EXPECT_EQ(host.project.position().getValue(), 5.0);
+}
+
+TEST_P(HostPreviewTest, ForgetsItsRequestsWhenItIsSwitchedOff)
+{
+    adapter().setPreviewActive(true);
+    adapter().startPreview(changes(), 0, 0, 1);
+    adapter().startCadrel();
+
+    adapter().setPreviewActive(false);
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"End Preview"}));
+}
+
+TEST_P(HostPreviewTest, GoesBackToAPreviewThatWasOnWhenItWasNeverSwitchedOn)
+{
+    // What is restored is what stood in the model, which a preview that goes on alone finds switched off.
+    host.model().setPreviewActive(true);
+    host.preview(changes());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+}
+
+// The end of the preview that leaves it switched on.
+
+TEST_P(HostPreviewTest, CanBeEmptiedWhileItIsOn)
+{
+    previewAll();
+    const Span cycle = transportCycle();
+
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_FALSE(hasOffset());
+    EXPECT_EQ(transportCycle(), cycle);
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"Delete Preview Range"}));
+    EXPECT_EQ(adapter().endPreview(), Result::Ok) << "There is none any more.";
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"Delete Preview Range"}));
+}
+
+TEST_P(HostPreviewTest, GoesBackToWhenItWasOffAlsoWhereItWasOnlyEmptied)
+{
+    adapter().setPreviewActive(true);
+
+    adapter().endPreview();
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+    ASSERT_EQ(host.undoNames(), entriesBeforeAnd({u"Delete Preview Range"}));
+    ASSERT_TRUE(host.undo());
+    EXPECT_FALSE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, ForgetsItsRequestsWhenItIsEmptied)
+{
+    adapter().setPreviewActive(true);
+    adapter().startPreview(changes(), 0, 0, 1);
+    adapter().startCadrel();
+
+    adapter().endPreview();
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Delete Preview Range"}));
+}
+
+TEST_P(HostPreviewTest, KeepsWhatItHasDoneWhenItCannotBeEmptied)
+{
+    previewAll();
+    host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(1e300));
+
+    EXPECT_EQ(adapter().endPreview(), Result::HostCallFailed) << "The host has no such time.";
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"Delete Preview Range (incomplete)"}));
+    EXPECT_FALSE(host.isEditOpen());
+}
+
+TEST_P(HostPreviewTest, SaysThatItsEndIsIncomplete)
+{
+    previewAll();
+    host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(1e300));
+
+    EXPECT_EQ(thrownBy([&] { adapter().setPreviewActive(false); }), Result::HostCallFailed);
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"End Preview (incomplete)"}));
+    EXPECT_FALSE(adapter().isPreviewActive());
+}
+
+// More than one project.
+
+TEST_P(HostPreviewTest, IsForgottenWhenTheProjectChanges)
+{
+    adapter().setPreviewActive(true);
+    adapter().startPreview(changes(), 0, 0, 1);
+    standin::Project& other = host.application.createProject();
+
+    host.application.activateProject(&other);
+    host.idle();
+    host.application.activateProject(&host.project);
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+    EXPECT_TRUE(adapter().isPreviewActive()) << "That is the project's own.";
+    // Nothing is lowered around the next one any more.
+    host.preview(changes());
+    ASSERT_TRUE(host.undo());
+    EXPECT_TRUE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, BelongsToItsProject)
+{
+    previewAll();
+    standin::Project& other = host.application.createProject();
+
+    host.application.activateProject(&other);
+    EXPECT_FALSE(adapter().isPreviewActive());
+    adapter().setPreviewActive(true);
+    adapter().setPreviewActive(false);
+    host.application.activateProject(&host.project);
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_TRUE(isLocked(track));
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_FALSE(isLocked(track));
+}
+
+TEST_P(HostPreviewTest, SurvivesTheCloseOfItsProject)
+{
+    previewAll();
+    adapter().startPreview(changes(), 0, 0, 1);
+    host.application.createProject();
+
+    host.adapter().projectClosing(host.document(), 0);
+    host.idle();
+
+    EXPECT_EQ(adapter().getProjectModel(), nullptr);
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview"}));
+}
+
+TEST_P(HostPreviewTest, GoesOnAfterASaveAndALoad)
+{
+    previewAll();
+    host.project.announceStoring();
+    host.adapter().projectClosing(host.document(), 0);
+    host.adapter().projectOpened(host.document());
+    host.adapter().projectActivated(host.document());
+
+    ASSERT_TRUE(adapter().isPreviewActive());
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_EQ(transportCycle(), Span(4.0, 9.0));
+    EXPECT_TRUE(host.alerts->messages.empty());
+}
+
+// Memos.
+
+TEST_P(HostMemoTest, FollowWhatTheUserDoesToTheirCopies)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 to 10 s, shown from 10 s on
+    host.idle();
+    const Node hiss = copyOf(u"hiss");
+    const Node click = copyOf(u"click");
+
+    edit([&] {
+        click->setStart(nullptr, 0, inPreview(17.0));
+        hiss->setName(nullptr, standin::tests::text(u"hum").get(), 0);
+    });
+    EXPECT_EQ(filmMemos(), (Texts{"hum 2-4", "click 7-7", "far 30-30"}));
+
+    edit([&] { hiss->setEnd(nullptr, 0, inPreview(15.0)); });
+    EXPECT_EQ(filmMemos(), (Texts{"hum 2-5", "click 7-7", "far 30-30"}));
+
+    host.addPointMarker(memos, u"pop", inPreview(11.0));
+    EXPECT_EQ(filmMemos(), (Texts{"pop 1-1", "hum 2-5", "click 7-7", "far 30-30"}));
+
+    edit([&] { host.transaction()->remove(memos.get(), hiss.get()); });
+    EXPECT_EQ(filmMemos(), (Texts{"pop 1-1", "click 7-7", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, GoBackWithTheEditThatTheyFollowed)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+    const Texts before = filmMemos();
+
+    edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
+    ASSERT_NE(filmMemos(), before);
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(filmMemos(), before);
+}
+
+TEST_P(HostMemoTest, StayAsTheyAreWhileARunWorksOnThem)
+{
+    adapter().setPreviewActive(true);
+    host.preview(changes());
+    host.idle();
+
+    host.conform();
+
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 12-14", "click 16-16"})) << "They went where the change events took them.";
+    edit([&] { host.addPointMarker(memos, u"late", host.inHost(18.0)); });
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 12-14", "click 16-16", "late 18-18"}))
+        << "There is no preview any more whose copies could be missed.";
+}
+
+TEST_P(HostMemoTest, StayWhenThePreviewEndsOrIsEmptied)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+
+    adapter().endPreview();
+    host.addPointMarker(memos, u"late", host.inHost(18.0));
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "late 18-18", "far 30-30"}));
+
+    adapter().setPreviewActive(false);
+    host.addPointMarker(memos, u"later", host.inHost(19.0));
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "late 18-18", "later 19-19", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, FollowThePreviewThatAnUndoBroughtBack)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.preview(secondChange()); // 10 to 20 s, which has no memos
+    host.idle();
+    ASSERT_TRUE(host.undo());
+    host.idle();
+
+    edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
+
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 7-7", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, StayWhenThePreviewIsUndone)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+    ASSERT_TRUE(host.undo());
+
+    host.addPointMarker(memos, u"late", host.inHost(8.0));
+
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "late 8-8", "far 30-30"}));
+}
+
+} // namespace cadrel::host::tests

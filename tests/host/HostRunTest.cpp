@@ -1,0 +1,548 @@
+// A run from its request to the undo list, on the tracks of a project.
+
+#include "core/ChangeContext.h"
+#include "host/Host.h"
+#include "host/Project.h"
+#include "host/TrackRole.h"
+#include "standin/services/IdleManager.h"
+#include "tests/core/RecordingListener.h"
+#include "tests/host/AdaptedHost.h"
+#include "tests/host/WatchedProgress.h"
+#include "velmark/Transport.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstddef>
+#include <string>
+#include <vector>
+
+namespace cadrel::host::tests {
+namespace {
+
+using namespace Velmark;
+using core::ChangeContext;
+using util::Result;
+
+using Texts = std::vector<std::string>;
+using Entries = AdaptedHost::Entries;
+
+/// What the listeners are told that has to do with runs.
+class ActionListener : public core::ChangeContextListenerInterface {
+public:
+    std::vector<std::int32_t> actions;
+
+    void onChange(const ChangeContext& context) override
+    {
+        if (const auto* action = dynamic_cast<const core::ActionChangeContext*>(&context))
+            actions.push_back(action->action);
+    }
+};
+
+/// A transport that tells when it is stopped.
+class StoppedTransport : public Implements<StoppedTransport, FObject, ITransportControl> {
+public:
+    static constexpr const char* ClassName = "StoppedTransport";
+
+    int stops = 0;
+    int32 answer = ResultOk;
+
+    IParameter* getParameter(const char*) override { return nullptr; }
+    double getPosition() override { return 0.0; }
+    int32 setPosition(double) override { return ResultOk; }
+    int32 stop() override
+    {
+        ++stops;
+        return answer;
+    }
+};
+
+/// Knows one word of another language.
+class GermanTranslations : public Implements<GermanTranslations, FObject, ITranslationService> {
+public:
+    static constexpr const char* ClassName = "GermanTranslations";
+
+    int32 addTable(BundleHandle, const char*, const char*) override { return ResultOk; }
+    const char16_t* translate(const char16_t* text) override
+    {
+        return std::u16string_view(text) == u"Apply Cadrel" ? u"Cadrel anwenden" : text;
+    }
+};
+
+/// A film of two clips of ten seconds that change places.
+class HostRunTest : public AtEachOrigin {
+protected:
+    HostRunTest()
+    {
+        host.addSound(track, u"one", 0.0, 10.0);
+        host.addSound(track, u"two", 10.0, 20.0);
+        host.switchMarkersOff();
+        host.carryOver("01:00:00:00", "01:00:10:00", "01:00:10:00", "01:00:20:00");
+        host.carryOver("01:00:10:00", "01:00:20:00", "01:00:00:00", "01:00:10:00");
+        host.adapter().addListener(&heard);
+        entriesBefore = host.undoNames();
+    }
+    ~HostRunTest() override { host.adapter().removeListener(&heard); }
+
+    Entries entriesBeforeAnd(std::initializer_list<std::u16string> names) const
+    {
+        Entries entries = entriesBefore;
+        entries.insert(entries.end(), names);
+        return entries;
+    }
+    /// The progress that the runs from now on have.
+    Counted<WatchedProgress> watch()
+    {
+        auto progress = makeCounted<WatchedProgress>();
+        host.altered.replace(IProgressService::iid, progress);
+        return progress;
+    }
+    /// Requests a run, so that the preview offset is there: the bytes that it begins with.
+    std::string requestRun()
+    {
+        EXPECT_EQ(host.adapter().startCadrel(), Result::Ok);
+        return host.bytes();
+    }
+
+    AdaptedHost host{GetParam()};
+    ActionListener heard;
+    AdaptedHost::Node track = host.addTrack(TypeWord::Audio, u"DX");
+    Entries entriesBefore;
+};
+
+INSTANTIATE_TEST_SUITE_P(Origins, HostRunTest, testing::Values(0.0, 3600.0));
+
+} // namespace
+
+TEST_P(HostRunTest, CarriesTheMaterialOver)
+{
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+    EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    EXPECT_FALSE(host.isEditOpen());
+}
+
+TEST_P(HostRunTest, IsOneEntryThatUndoAndRedoTakeToTheSameBytes)
+{
+    host.settings().setCreateDestinationMarkers(true);
+    host.settings().setCreateInsertMarkers(true);
+    const std::string before = requestRun();
+
+    host.idle();
+    const std::string after = host.bytes();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    ASSERT_NE(before, after);
+    for (int round = 0; round < 2; ++round) {
+        ASSERT_TRUE(host.undo());
+        EXPECT_EQ(host.bytes(), before);
+        ASSERT_TRUE(host.redo());
+        EXPECT_EQ(host.bytes(), after);
+    }
+}
+
+TEST_P(HostRunTest, RunsOncePerRequest)
+{
+    host.conform();
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    EXPECT_EQ(heard.actions.size(), 1U);
+}
+
+TEST_P(HostRunTest, CanBeMadeAgain)
+{
+    host.conform();
+    host.conform();
+
+    // Changed places twice.
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel", u"Apply Cadrel"}));
+}
+
+TEST_P(HostRunTest, MakesTheTracksOfTheMarkersThatAreOn)
+{
+    host.settings().setCreateDestinationMarkers(true);
+    host.settings().setCreateOverlapMarkers(true);
+
+    host.conform();
+
+    const auto folder = host.trackNamed(u"Cadrel Markers");
+    ASSERT_TRUE(folder);
+    EXPECT_EQ(standin::tests::namesOf(*folder), (Entries{u"Destination", u"Overlap", u"Memos"}));
+    EXPECT_EQ(host.contentOf(host.trackNamed(u"Destination")),
+              (Texts{"Event: 2 - A001  0-10", "Event: 1 - A001  10-20"}));
+}
+
+TEST_P(HostRunTest, BringsTheMarkersToTheNewProgramme)
+{
+    host.settings().setCreateInsertMarkers(true);
+    const auto shot = cadrel::tests::makeEvent("B002", "02:00:00:00", "02:00:05:00", "01:00:20:00", "01:00:25:00", 3);
+    host.model().newEdl().add(shot);
+
+    host.conform();
+
+    // What no change event covers is new: the whole of the one new shot.
+    const Texts inserts = host.contentOf(host.trackNamed(u"Insert"));
+    ASSERT_EQ(inserts.size(), 1U);
+    EXPECT_TRUE(inserts.front().ends_with(" 20-25")) << inserts.front();
+}
+
+TEST_P(HostRunTest, JoinsWhatTheCutsHaveLeftOfAClip)
+{
+    // Nothing moves here, but the clip goes over in two pieces.
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00");
+    host.carryOver("01:00:05:00", "01:00:20:00", "01:00:05:00", "01:00:20:00");
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+}
+
+TEST_P(HostRunTest, ChangesTheSelectedTracksAlone)
+{
+    const auto other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"door", 0.0, 2.0);
+    dynamic_cast<standin::Node&>(*track).setSelected(true);
+    host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+    EXPECT_EQ(host.contentOf(other), Texts{"door 0-2"});
+}
+
+TEST_P(HostRunTest, ChangesOnlyTheRangeToWhichItIsRestricted)
+{
+    host.addSound(track, u"three", 30.0, 40.0);
+    host.settings().setRestrictRange(true);
+    host.settings().setPreserveMaterial(host.onClock(0.0), host.onClock(10.0));
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "two 10-20", "three 30-40"}));
+}
+
+TEST_P(HostRunTest, LeavesOutWhatHasNoTimecodes)
+{
+    host.carryOver("25:00:00:00", "26:00:00:00", "25:00:00:00", "26:00:00:00");
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+}
+
+TEST_P(HostRunTest, WritesTheNewPictureAtItsPlace)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:05:00"), core::Timecode("00:00:04:00")),
+        false);
+
+    host.conform();
+
+    const auto video = host.trackNamed(u"New Video");
+    ASSERT_TRUE(video);
+    const auto events = standin::tests::childrenOf(*video);
+    ASSERT_EQ(events.size(), 1U);
+    EXPECT_DOUBLE_EQ(events[0]->getStart(nullptr), host.inHost(5.0));
+    EXPECT_DOUBLE_EQ(events[0]->getEnd(nullptr), host.inHost(9.0));
+}
+
+TEST_P(HostRunTest, LetsTheAutomationRunStraightOverWhatNothingCovers)
+{
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00");
+    host.carryOver("01:00:10:00", "01:00:15:00", "01:00:10:00", "01:00:15:00");
+    host.addPoint(track, standin::Envelope::Curve::Volume, host.inHost(1.0), 0.25F);
+    host.addPoint(track, standin::Envelope::Curve::Volume, host.inHost(12.0), 0.75F);
+    host.settings().setCreateVirginTerritories(true);
+    const auto progress = watch();
+
+    host.conform();
+
+    EXPECT_EQ(std::ranges::count(progress->calls, "Processing Project - Virgin Territories"), 1);
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(track, standin::Envelope::Curve::Volume));
+    // On the old line at 5 s and at 10 s, and straight between them.
+    const auto onLine = [](double time) { return 0.25 + 0.5 * (time - 1.0) / 11.0; };
+    for (const double time : {4.0, 5.0, 7.5, 10.0, 11.0})
+        EXPECT_NEAR(curve.valueBehind(host.inHost(time)).value_or(-1.0), onLine(time), 1e-6) << time;
+}
+
+// The frame around a run.
+
+TEST_P(HostRunTest, ShowsHowFarItIs)
+{
+    const auto progress = watch();
+    host.settings().setCreateOverlapMarkers(true);
+    bool wasBlocked = true;
+    progress->whenCalled = [&] {
+        if (progress->calls.back() != "begin" && progress->calls.back() != "end")
+            wasBlocked = wasBlocked && host.application.idleManager().isBlocked();
+    };
+
+    host.conform();
+
+    EXPECT_TRUE(progress->canCancel());
+    EXPECT_TRUE(wasBlocked) << "Idle calls are blocked while it goes on.";
+    EXPECT_FALSE(host.application.idleManager().isBlocked());
+    Texts texts = progress->calls;
+    std::erase_if(texts, [](const std::string& call) { return call.starts_with("tick"); });
+    // 2 events on the one track, a step more for the run, and 2 of the detection.
+    EXPECT_EQ(texts, (Texts{"begin", "setStatus", "setRange 5", "Processing Project", "show",
+                            "Processing Project - Event: 1 - A001 ", "Processing Project - Event: 2 - A001 ",
+                            "Processing Project - Overlap Markers", "Processing Project - Generate Markers",
+                            "setRange 0", "Processing Project - Completing", "end"}));
+}
+
+TEST_P(HostRunTest, StopsTheTransportFirst)
+{
+    host.adapter().removeListener(&heard);
+    host.project.announceStoring();
+    host.disconnect();
+    const auto transport = makeCounted<StoppedTransport>();
+    host.altered.replace(ITransportControl::iid, transport);
+    host.connect();
+    host.adapter().addListener(&heard);
+
+    host.conform();
+    EXPECT_EQ(transport->stops, 1);
+
+    transport->answer = ResultFalse;
+    host.conform();
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"})) << "Nothing is run into a transport that runs.";
+}
+
+TEST_P(HostRunTest, DoesNotHearOfItsOwnEdits)
+{
+    const auto progress = watch();
+    core::EventBase& event = host.carryOver("01:00:00:24", "01:00:10:00", "01:00:30:00", "01:00:39:01");
+    progress->whenCalled = [&] {
+        if (!host.isEditOpen())
+            return;
+        host.project.setFrameRate({24.0, 0});
+        EXPECT_EQ(host.adapter().update(host.document(), 0), ResultOk);
+        EXPECT_EQ(host.adapter().projectEdited(host.document(), nullptr), ResultOk);
+        EXPECT_FALSE(event.hasFlaw(core::EventFlaw::TimecodeInvalid)) << "It looks at the new rate after the run.";
+        host.project.setFrameRate({25.0, 0});
+    };
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    EXPECT_GT(progress->calls.size(), 5U);
+}
+
+TEST_P(HostRunTest, BeginsNoSecondRunWithinARun)
+{
+    const auto progress = watch();
+    progress->whenCalled = [&] { host.adapter().onIdle(); };
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    EXPECT_EQ(heard.actions.size(), 1U);
+}
+
+TEST_P(HostRunTest, RunsBeforeItPreviewsWhenBothAreRequested)
+{
+    host.adapter().startPreview(host.model().changeEdl(), 0, 0, 0);
+    host.adapter().startCadrel();
+
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel", u"Preview"}));
+    EXPECT_EQ(heard.actions, (std::vector<std::int32_t>{1, 0}));
+}
+
+// Cancelled runs.
+
+TEST_P(HostRunTest, LeavesEverythingAsItWasWhereverItIsCancelled)
+{
+    host.settings().setCreateDestinationMarkers(true);
+    host.settings().setCreateOverlapMarkers(true);
+    host.settings().setCreateAudioSnippetMarkers(true);
+    host.settings().setCreateAutomationWarningMarkers(true);
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:05:00"), core::Timecode("00:00:04:00")),
+        false);
+    const std::string before = requestRun();
+    const auto progress = watch();
+    host.idle();
+    const std::string after = host.bytes();
+    const std::size_t callCount = progress->calls.size();
+    ASSERT_TRUE(host.undo());
+    ASSERT_EQ(host.bytes(), before);
+
+    std::size_t takenBack = 0;
+    std::size_t lastTakenBack = 0;
+    for (std::size_t call = 1; call <= callCount; ++call) {
+        progress->calls.clear();
+        // The handler forgets what was cancelled before it has shown its window.
+        progress->whenCalled = [&] {
+            if (progress->calls.size() == call)
+                progress->cancel();
+        };
+        host.conform();
+
+        EXPECT_FALSE(host.isEditOpen());
+        EXPECT_FALSE(host.application.idleManager().isBlocked());
+        const bool isTakenBack = host.undoNames() == entriesBefore;
+        EXPECT_EQ(host.bytes(), isTakenBack ? before : after) << "cancelled in call " << call;
+        if (isTakenBack) {
+            ++takenBack;
+            lastTakenBack = call;
+        } else {
+            EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+            ASSERT_TRUE(host.undo());
+        }
+        ASSERT_EQ(host.bytes(), before);
+    }
+
+    EXPECT_GT(takenBack, 5U);
+    EXPECT_LT(lastTakenBack, callCount) << "Behind the last question it is too late.";
+    EXPECT_EQ(heard.actions.size(), 1U + callCount) << "Cancelled or not, it is told that a run has ended.";
+}
+
+TEST_P(HostRunTest, DoesNothingMoreOnceItIsCancelled)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:05:00"), core::Timecode("00:00:04:00")),
+        false);
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") != std::string::npos)
+            progress->cancel();
+    };
+    host.conform();
+    ASSERT_EQ(host.undoNames(), entriesBefore);
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    EXPECT_FALSE(host.trackNamed(u"New Video")) << "The first event was carried over, and that was all.";
+}
+
+TEST_P(HostRunTest, TakesTheChangesOfTheModelBackWithTheRun)
+{
+    // What stands in the model when the run begins comes back, and no more than that.
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (host.isEditOpen())
+            host.model().setProperty(core::PropertyKey::LastEdlFolder, core::Variant("/edl"));
+        if (progress->calls.back().find("Event: 1") != std::string::npos)
+            progress->cancel();
+    };
+
+    host.conform();
+
+    EXPECT_FALSE(host.model().hasProperty(core::PropertyKey::LastEdlFolder));
+}
+
+// Runs that fail.
+
+TEST_P(HostRunTest, KeepsWhatItHasDoneWhenItFails)
+{
+    const std::string before = requestRun();
+    host.altered.hide(ClassId::ObjectList);
+
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
+    EXPECT_FALSE(host.isEditOpen());
+    EXPECT_FALSE(host.application.idleManager().isBlocked());
+    EXPECT_TRUE(host.trackNamed(u"Memos"));
+    EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    EXPECT_TRUE(host.alerts->messages.empty());
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.bytes(), before);
+}
+
+TEST_P(HostRunTest, CanBeMadeAfterOneThatFailed)
+{
+    requestRun();
+    AlteredContext& altered = host.altered;
+    altered.hide(IEditService::iid);
+    host.idle();
+    EXPECT_EQ(host.undoNames(), entriesBefore) << "Without a transaction nothing was done.";
+
+    altered.unhide(IEditService::iid);
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostRunTest, LeavesATransactionAloneThatAnotherHasOpen)
+{
+    const std::string before = requestRun();
+    ASSERT_EQ(host.transaction()->begin(true), ResultOk);
+
+    host.adapter().onIdle();
+
+    EXPECT_TRUE(host.isEditOpen());
+    EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    ASSERT_EQ(host.transaction()->commit(host.document(), u"Other"), ResultOk);
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+    EXPECT_EQ(host.bytes(), before);
+}
+
+TEST_P(HostRunTest, DoesNothingWhereThereIsNoProgress)
+{
+    const std::string before = requestRun();
+    host.altered.hide(IProgressService::iid);
+
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+    EXPECT_EQ(host.bytes(), before);
+    EXPECT_FALSE(host.application.idleManager().isBlocked());
+}
+
+TEST_P(HostRunTest, RunsWhereIdleCallsCannotBeBlocked)
+{
+    requestRun();
+    host.altered.hide(IIdleManager::iid);
+
+    host.idle();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostRunTest, IsForgottenWhenTheProjectChanges)
+{
+    requestRun();
+    standin::Project& other = host.application.createProject();
+    host.application.activateProject(&other);
+    host.application.activateProject(&host.project);
+
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+    EXPECT_EQ(other.undoList().size(), 0U);
+    EXPECT_TRUE(heard.actions.empty());
+}
+
+TEST_P(HostRunTest, RunsOnTheActiveOfTwoProjects)
+{
+    standin::Project& other = host.application.createProject();
+    host.application.activateProject(&other);
+    host.application.activateProject(&host.project);
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+    EXPECT_EQ(other.undoList().size(), 0U);
+}
+
+TEST_P(HostRunTest, TranslatesTheNameOfItsEntry)
+{
+    host.altered.replace(ITranslationService::iid, makeCounted<GermanTranslations>());
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames().back(), u"Cadrel anwenden");
+}
+
+} // namespace cadrel::host::tests
