@@ -36,6 +36,11 @@ function(cadrel_juce_library target)
     if(ARGN)
         set_target_properties(${target} PROPERTIES COMPILE_OPTIONS "${ARGN}")
     endif()
+    if(CADREL_CCACHE)
+        # A module holds the time of its compilation, and would never be found in the cache for it.
+        set_target_properties(${target} PROPERTIES CXX_COMPILER_LAUNCHER
+            "${CMAKE_COMMAND};-E;env;CCACHE_SLOPPINESS=time_macros;${CADREL_CCACHE}")
+    endif()
 endfunction()
 
 cadrel_juce_library(cadrel_juce)

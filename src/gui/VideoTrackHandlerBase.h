@@ -12,11 +12,10 @@ class VideoTrackHandlerBase {
 public:
     /// What a channel's track carries.
     struct Mode {
-        static constexpr std::int32_t None = -1; ///< there is no track
-        static constexpr std::int32_t Old = 0;   ///< the old picture
-        static constexpr std::int32_t New = 1;   ///< the new picture
-        static constexpr std::int32_t OldOff =
-            2; ///< it stands for the old picture, but carries another by the user's choice
+        static constexpr std::int32_t None = -1;  ///< there is no track
+        static constexpr std::int32_t Old = 0;    ///< the old picture
+        static constexpr std::int32_t New = 1;    ///< the new picture
+        static constexpr std::int32_t OldOff = 2; ///< stands for the old picture, but the user has put another there
         static constexpr std::int32_t NewOff = 3; ///< likewise for the new one
     };
 

@@ -164,7 +164,7 @@ private:
                                     const std::function<void()>& work);
     /// Carries out steps as one entry of the undo list. What they throw is the result, and the name of the entry says so.
     util::Result::Type edit(const EntryName& name, const std::function<void(Velmark::IEditTransaction&)>& steps);
-    void commit(const char16_t* name);
+    util::Result::Type commit(const char16_t* name);
     void takeBack();
     void restoreCycles();
     void keepCycles();
@@ -180,7 +180,7 @@ private:
     Velmark::Counted<Velmark::IProjectManager> m_projectManager;
     std::map<Velmark::IProjectDocument*, OpenProject> m_projects;
     Project* m_currentProject = nullptr; ///< not owned
-    /// The one that still has to be committed; nothing outside of a run, a preview or the end of one.
+    /// The one that is open and has to be committed; nothing outside of a run, a preview or the end of one.
     Velmark::Counted<Velmark::IEditTransaction> m_transaction;
     Velmark::Counted<Velmark::IHostContext> m_serviceContext;
     Transport m_transport;

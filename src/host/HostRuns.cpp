@@ -241,34 +241,30 @@ Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTra
 {
     core::EventList& previewed = m_currentProject->previewEvents();
     const PreviewEventsStep::Events previewedBefore = previewed.events();
-    const auto keepPreviewed = [&](IEditTransaction& transaction) {
-        if (previewed.events() != previewedBefore)
-            transaction.addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get());
-    };
     m_processing = true;
-    const Result::Type result = resultOf([&] {
+    Result::Type result = resultOf([&] {
         auto transaction = required(query<IEditTransaction>(required(service<IEditService>(m_serviceContext))));
         requireOk(transaction->begin(true));
         m_transaction = std::move(transaction);
         steps(*m_transaction);
-        keepPreviewed(*m_transaction);
-        commit(name.done);
     });
     if (m_transaction) {
-        resultOf([&] {
-            keepPreviewed(*m_transaction);
+        if (previewed.events() != previewedBefore)
+            m_transaction->addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get());
+        if (result == Result::Ok)
+            result = commit(name.done);
+        if (result != Result::Ok)
             commit(name.incomplete);
-        });
         m_transaction.reset();
     }
     m_processing = false;
     return result;
 }
 
-void Host::commit(const char16_t* name)
+Result::Type Host::commit(const char16_t* name)
 {
-    requireOk(m_transaction->commit(m_currentProject->document(), m_translator->translate(name)));
-    m_transaction.reset();
+    return resultOf(
+        [&] { requireOk(m_transaction->commit(m_currentProject->document(), m_translator->translate(name))); });
 }
 
 /// Undoes the run that the user has cancelled.

@@ -9,6 +9,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <iterator>
 #include <utility>
 
 using cadrel::core::SecondsRange;
@@ -112,24 +113,19 @@ std::vector<HostEvent> MemoSync::memosIn(const Track& memos, const SecondsRange&
     return found;
 }
 
-MemoSync::Memos MemoSync::stateOf(const Track& memos, const std::vector<Stretch>& stretches) const
+MemoSync::Memo MemoSync::memoOf(const HostEvent& event)
 {
-    Memos state;
-    for (const Stretch& stretch : stretches) {
-        for (const HostEvent& copy : memosIn(memos, stretch.preview))
-            state.push_back({copy.getUserId(), copy.getName(), copy.getStart(), copy.getEnd()});
-    }
-    return state;
+    return {event.getUserId(), event.getName(), event.getStart(), event.getEnd()};
 }
 
 void MemoSync::remember(const Track& memos)
 {
     const Events& events = m_project.previewEvents().events();
-    std::erase_if(m_remembered,
-                  [&events](const auto& entry) { return std::ranges::find(events, entry.first) == events.end(); });
+    m_remembered.clear();
     for (std::size_t index = 0; index < events.size(); ++index) {
-        if (!m_remembered.contains(events[index]))
-            m_remembered.emplace(events[index], stateOf(memos, stretchesOf(m_project, events, index)));
+        Memos& copies = m_remembered[events[index]];
+        for (const Stretch& stretch : stretchesOf(m_project, events, index))
+            std::ranges::transform(memosIn(memos, stretch.preview), std::back_inserter(copies), memoOf);
     }
 }
 
@@ -137,24 +133,20 @@ void MemoSync::follow(const Track& memos, IEditTransaction& transaction)
 {
     const Events& events = m_project.previewEvents().events();
     for (std::size_t index = 0; index < events.size(); ++index) {
-        const std::vector<Stretch> stretches = stretchesOf(m_project, events, index);
         const auto remembered = m_remembered.find(events[index]);
-        const bool isKnown = remembered != m_remembered.end();
-        // Where two events show the same source, only the one whose copy was edited is to be followed.
-        if (isKnown && remembered->second == stateOf(memos, stretches))
-            continue;
-        for (const Stretch& stretch : stretches)
-            followStretch(memos, transaction, stretch, isKnown ? &remembered->second : nullptr);
+        for (const Stretch& stretch : stretchesOf(m_project, events, index))
+            followStretch(memos, transaction, stretch,
+                          remembered != m_remembered.end() ? &remembered->second : nullptr);
     }
-    m_remembered.clear();
-    remember(memos);
 }
 
 void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, const Stretch& stretch,
                              const Memos* remembered)
 {
     std::vector<HostEvent> copies = memosIn(memos, stretch.preview);
-    std::vector<HostEvent> sources = sourceMemos(memos, stretch, copies, remembered);
+    std::vector<HostEvent> sources = sourcesOf(memos, stretch, copies);
+    if (remembered)
+        keepEdited(copies, sources, *remembered);
     const std::size_t copyCount = copies.size();
     const std::size_t sourceCount = sources.size();
 
@@ -164,12 +156,13 @@ void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, 
             carryOver(transaction, copy, memo, stretch);
         return static_cast<bool>(memo);
     });
-    // What is left has no partner.
-    if (sourceCount > copyCount) {
+    // What is left has no partner. As long as nothing is known of what the user has done, the numbers tell whether he has
+    // removed or written something.
+    if (remembered || sourceCount > copyCount) {
         for (HostEvent& memo : sources)
             memo.remove(transaction);
     }
-    if (copyCount > sourceCount) {
+    if (remembered || copyCount > sourceCount) {
         for (HostEvent& copy : copies) {
             copy.setUserId(memos.nextUserId());
             Marker{stretch.toSource(copy.getStart()),
@@ -182,17 +175,10 @@ void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, 
     }
 }
 
-std::vector<HostEvent> MemoSync::sourceMemos(const Track& memos, const Stretch& stretch,
-                                             const std::vector<HostEvent>& copies, const Memos* remembered) const
+std::vector<HostEvent> MemoSync::sourcesOf(const Track& memos, const Stretch& stretch,
+                                           const std::vector<HostEvent>& copies) const
 {
     std::vector<HostEvent> found = memosIn(memos, stretch.source);
-    // What the user has written there since belongs to the real programme alone.
-    if (remembered) {
-        std::erase_if(found, [&](const HostEvent& memo) {
-            const std::int64_t id = memo.getUserId();
-            return !hasId(copies, id) && std::ranges::find(*remembered, id, &Memo::id) == remembered->end();
-        });
-    }
     // A memo that only reaches into the stretch has its copy there, too.
     for (HostEvent& memo : memos.clipEvents()) {
         const bool reachesIn =
@@ -202,6 +188,22 @@ std::vector<HostEvent> MemoSync::sourceMemos(const Track& memos, const Stretch& 
             found.push_back(std::move(memo));
     }
     return found;
+}
+
+void MemoSync::keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered)
+{
+    // Another copy of the same memo may have been edited, or the memo itself.
+    std::erase_if(copies, [&](const HostEvent& copy) {
+        const bool isUntouched = std::ranges::find(remembered, memoOf(copy)) != remembered.end();
+        if (isUntouched)
+            takeById(sources, copy.getUserId());
+        return isUntouched;
+    });
+    // What the user has written in the real programme meanwhile has no copy that he could have removed.
+    std::erase_if(sources, [&](const HostEvent& memo) {
+        const std::int64_t id = memo.getUserId();
+        return !hasId(copies, id) && std::ranges::find(remembered, id, &Memo::id) == remembered.end();
+    });
 }
 
 void MemoSync::carryOver(IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo, const Stretch& stretch)

@@ -23,17 +23,17 @@ class Project;
 class Track;
 
 /// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
-/// copy have the same user id.
+/// copy have the same user id. What the user doesn't touch stays as it is, also where two events show the same memo.
 class MemoSync {
 public:
     explicit MemoSync(Project& project) : m_project(project) {}
 
-    /// Carries over what differs, for each previewed event whose stretch isn't as it was remembered. Needs the preview
-    /// offset. Throws Result::HostObjectMissing and Result::HostCallFailed.
+    /// Carries over what has become of the copies since they were remembered or, where they weren't, whatever differs. Needs
+    /// the preview offset. Throws Result::HostObjectMissing and Result::HostCallFailed.
     void follow(const Track& memos, Velmark::IEditTransaction& transaction);
-    /// Notes the stretches of the events that are previewed since the last time. What is edited in the real programme
-    /// stays as it is until the copies are edited, too.
+    /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.
     void remember(const Track& memos);
+    void forget() { m_remembered.clear(); }
 
 private:
     /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's
@@ -58,12 +58,14 @@ private:
 
     static std::vector<Stretch> stretchesOf(const Project& project, const Events& events, std::size_t index);
     std::vector<HostEvent> memosIn(const Track& memos, const core::SecondsRange& range) const;
-    /// What stands in the preview stretches of an event.
-    Memos stateOf(const Track& memos, const std::vector<Stretch>& stretches) const;
+    static Memo memoOf(const HostEvent& event);
     void followStretch(const Track& memos, Velmark::IEditTransaction& transaction, const Stretch& stretch,
                        const Memos* remembered);
-    std::vector<HostEvent> sourceMemos(const Track& memos, const Stretch& stretch, const std::vector<HostEvent>& copies,
-                                       const Memos* remembered) const;
+    /// The memos that a stretch shows.
+    std::vector<HostEvent> sourcesOf(const Track& memos, const Stretch& stretch,
+                                     const std::vector<HostEvent>& copies) const;
+    /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
+    static void keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered);
     static void carryOver(Velmark::IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo,
                           const Stretch& stretch);
 

@@ -26,9 +26,13 @@ namespace {
 void gatherTracks(IProjectNode& parent, std::vector<Counted<ITrackNode>>& tracks)
 {
     for (const Counted<IProjectNode>& child : childrenOf(parent)) {
-        if (auto track = query<ITrackNode>(child)) {
+        auto track = query<ITrackNode>(child);
+        if (track) {
             tracks.push_back(std::move(track));
             gatherTracks(*child, tracks);
+        } else if (child->isType(TypeWord::Track)) {
+            // Left out, it would be the one that doesn't fit a film that looks done.
+            throw Result::HostObjectMissing;
         }
     }
 }
@@ -223,8 +227,7 @@ void Project::onProjectChanged()
     m_indexes.clear();
     m_mediaPool.notifyListeners();
     tellListeners();
-    if (m_model.isPreviewActive() && hasPreviewOffset() && markerTrack(TrackRole::Memos).isAlive())
-        failure.ofStep([this] { m_memoSync.remember(markerTrack(TrackRole::Memos)); });
+    failure.ofStep([this] { rememberMemos(); });
     failure.raise();
 }
 
@@ -232,7 +235,7 @@ void Project::onProjectEdited(IEditTransaction& transaction)
 {
     FirstFailure failure;
     m_indexes.clear();
-    if (m_model.isPreviewActive() && hasPreviewOffset())
+    if (isPreviewing())
         failure.ofStep([&] { syncMemos(transaction); });
     tellListeners();
     failure.raise();
@@ -246,6 +249,20 @@ void Project::syncMemos(IEditTransaction& transaction)
         return;
     memos.assignIds(0.0, requiredOffset() - timeOrigin());
     m_memoSync.follow(memos, transaction);
+}
+
+void Project::rememberMemos()
+{
+    const Track& memos = markerTrack(TrackRole::Memos);
+    if (isPreviewing() && memos.isAlive())
+        m_memoSync.remember(memos);
+    else
+        m_memoSync.forget();
+}
+
+bool Project::isPreviewing() const
+{
+    return m_model.isPreviewActive() && hasPreviewOffset();
 }
 
 void Project::tellListeners()

@@ -176,7 +176,9 @@ private:
     Velmark::Counted<Velmark::IProjectNode> root() const;
     Velmark::IParameter& locator(const char* name) const;
     void tellListeners();
+    bool isPreviewing() const;
     void syncMemos(Velmark::IEditTransaction& transaction);
+    void rememberMemos();
 
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }

@@ -244,7 +244,8 @@ void Project::clearPreview(IEditTransaction& transaction)
 {
     const double offset = requiredOffset();
     setTracksLocked(false);
-    deleteRange(transaction, offset, offset + projectEnd());
+    // Automation may reach further than the events, which alone make the end of the project.
+    deleteRange(transaction, offset, offset + std::max(offset, projectEnd()));
 }
 
 void Project::getApplyRange(double& start, double& end) const

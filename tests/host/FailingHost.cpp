@@ -45,17 +45,29 @@ protected:
     template <class T, class Call>
     T* orNull(Call call)
     {
-        return m_host.fails() ? nullptr : dynamic_cast<T*>(m_host.wrap(call()));
+        return m_host.fails() ? nullptr : borrowed<T>(call);
     }
     /// For what is counted.
     template <class T, class Call>
     T* countedOrNull(Call call)
     {
-        if (m_host.fails())
-            return nullptr;
-        const auto given = Counted<T>::adopt(call());
-        T* const wrapped = dynamic_cast<T*>(m_host.wrap(given.get()));
-        return Counted<T>::share(wrapped).detach();
+        return m_host.fails() ? nullptr : counted<T>(call);
+    }
+    // The same where a refusal and null are answers, too.
+    template <class Call>
+    int32 orNone(Call call)
+    {
+        return m_host.failsToTell() ? FailingHost::Refusal : call();
+    }
+    template <class T, class Call>
+    T* orNothing(Call call)
+    {
+        return m_host.failsToTell() ? nullptr : borrowed<T>(call);
+    }
+    template <class T, class Call>
+    T* countedOrNothing(Call call)
+    {
+        return m_host.failsToTell() ? nullptr : counted<T>(call);
     }
     template <class T>
     static T* unwrapped(T* object)
@@ -66,6 +78,19 @@ protected:
     FailingHost& m_host;
 
 private:
+    template <class T, class Call>
+    T* borrowed(Call call)
+    {
+        return dynamic_cast<T*>(m_host.wrap(call()));
+    }
+    template <class T, class Call>
+    T* counted(Call call)
+    {
+        const auto given = Counted<T>::adopt(call());
+        T* const wrapped = dynamic_cast<T*>(m_host.wrap(given.get()));
+        return Counted<T>::share(wrapped).detach();
+    }
+
     Counted<FUnknown> m_real;
 };
 
@@ -175,7 +200,7 @@ public:
     }
     IMarkerTrack* getDefaultMarkerTrack() override
     {
-        return orNull<IMarkerTrack>([&] { return as<IProjectDocument>().getDefaultMarkerTrack(); });
+        return orNothing<IMarkerTrack>([&] { return as<IProjectDocument>().getDefaultMarkerTrack(); });
     }
     ILocators* getLocators() override
     {
@@ -215,11 +240,11 @@ public:
     }
     int32 getAttribute(const char* key, FVariant& value) override
     {
-        return orRefusal([&] { return node().getAttribute(key, value); });
+        return orNone([&] { return node().getAttribute(key, value); });
     }
     int32 hasAttribute(const char* key) override
     {
-        return orRefusal([&] { return node().hasAttribute(key); });
+        return orNone([&] { return node().hasAttribute(key); });
     }
     int32 removeAttribute(const char* key) override
     {
@@ -255,7 +280,7 @@ public:
     }
     IProjectNode* getParent() override
     {
-        return orNull<IProjectNode>([&] { return node().getParent(); });
+        return orNothing<IProjectNode>([&] { return node().getParent(); });
     }
 
     // ITrackNode
@@ -265,11 +290,11 @@ public:
     }
     int32 getFlag(const char* name) override
     {
-        return orRefusal([&] { return as<ITrackNode>().getFlag(name); });
+        return orNone([&] { return as<ITrackNode>().getFlag(name); });
     }
     IObjectList* getAutomation() override
     {
-        return countedOrNull<IObjectList>([&] { return as<ITrackNode>().getAutomation(); });
+        return countedOrNothing<IObjectList>([&] { return as<ITrackNode>().getAutomation(); });
     }
 
     // What lies on tracks.
@@ -281,11 +306,11 @@ public:
     }
     IEventNode* getOwner() override
     {
-        return orNull<IEventNode>([&] { return as<IEventNode>().getOwner(); });
+        return orNothing<IEventNode>([&] { return as<IEventNode>().getOwner(); });
     }
     IMediaClip* getClip() override
     {
-        return orNull<IMediaClip>([&] { return as<IClipEvent>().getClip(); });
+        return orNothing<IMediaClip>([&] { return as<IClipEvent>().getClip(); });
     }
     int32 setClip(IMediaClip* clip, int32 flags) override
     {

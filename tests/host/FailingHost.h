@@ -32,6 +32,15 @@ public:
     std::size_t callCount() const { return m_callCount; }
     /// Whether this call, which is one more, is the one.
     bool fails() { return ++m_callCount == m_failsAt; }
+    /// The same for a call by which the host says as well that there is nothing.
+    bool failsToTell()
+    {
+        const bool isTheOne = fails();
+        m_failedToTell = m_failedToTell || isTheOne;
+        return isTheOne;
+    }
+    /// Whether nobody could know the failure for one.
+    bool failedToTell() const { return m_failedToTell; }
     /// The objects that have come out and that somebody holds a reference to.
     std::size_t heldCount() const;
 
@@ -49,6 +58,7 @@ private:
     std::map<std::pair<Velmark::FUnknown*, Velmark::FObject*>, Velmark::Counted<Velmark::FObject>> m_dependents;
     std::size_t m_callCount = 0;
     std::size_t m_failsAt = 0;
+    bool m_failedToTell = false;
 };
 
 } // namespace cadrel::host::tests

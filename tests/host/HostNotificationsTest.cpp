@@ -7,6 +7,7 @@
 #include "gui/FileBrowserDialogBase.h"
 #include "host/Host.h"
 #include "host/Project.h"
+#include "host/VideoProvider.h"
 #include "tests/core/RecordingListener.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AdaptedHost.h"
@@ -15,7 +16,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cstddef>
 #include <memory>
+#include <stdexcept>
 #include <string>
 #include <utility>
 #include <vector>
@@ -61,6 +65,20 @@ protected:
 
     AdaptedHost host{0.0};
     RecordingListener heard;
+};
+
+/// A listener that isn't up to what it hears.
+class ThrowingListener : public core::ChangeContextListenerInterface {
+public:
+    void onChange(const ChangeContext&) override { throw std::runtime_error("unforeseen"); }
+};
+
+/// Counts the pictures that come.
+class PictureListener : public gui::VideoProviderBase::Listener {
+public:
+    int pictures = 0;
+
+    void imageChanged(std::size_t) override { ++pictures; }
 };
 
 /// A manager of projects of which some indexes are empty.
@@ -454,6 +472,42 @@ TEST_F(HostNotificationsTest, TellsNoFailureOfAnEditButTheOne)
     host.adapter().update(host.document(), 0);
 
     EXPECT_EQ(host.adapter().projectEdited(host.document(), nullptr), Result::HostObjectMissing);
+}
+
+TEST_F(HostNotificationsTest, LetsNoExceptionReachTheHost)
+{
+    ThrowingListener listener;
+    host.addTrack(TypeWord::Audio, u"DX");
+    host.carryOver("01:00:00:00", "01:00:10:00", "01:00:05:00", "01:00:15:00");
+    host.adapter().startCadrel();
+    host.adapter().addListener(&listener);
+
+    EXPECT_EQ(host.adapter().onIdle(), ResultOk);
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    EXPECT_EQ(host.adapter().projectDeactivated(host.document()), Result::NotAvailable);
+    EXPECT_EQ(host.adapter().getProjectModel(), nullptr);
+    EXPECT_EQ(host.adapter().projectActivated(host.document()), Result::NotAvailable);
+    EXPECT_NE(host.adapter().getProjectModel(), nullptr) << "It is active whatever its listeners make of it.";
+
+    host.adapter().removeListener(&listener);
+    host.idle();
+    EXPECT_EQ(std::ranges::count(host.undoNames(), u"Apply Cadrel"), 1) << "The request was lowered.";
+}
+
+TEST_F(HostNotificationsTest, BringsPicturesWithTheIdleCalls)
+{
+    const juce::ScopedJuceInitialiser_GUI fonts;
+    PictureListener listener;
+    VideoProvider& pictures = *host.adapter().getVideoProvider();
+    pictures.addListener(&listener);
+    pictures.setImageSize(64, 36);
+    EXPECT_EQ(listener.pictures, 0);
+
+    host.idle();
+
+    // Without any video there is a message for either side.
+    EXPECT_EQ(listener.pictures, 2);
+    pictures.removeListener(&listener);
 }
 
 TEST_F(HostNotificationsTest, IsOutOfTheWayOnceItHasGone)

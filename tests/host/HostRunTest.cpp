@@ -225,6 +225,24 @@ TEST_P(HostRunTest, ChangesOnlyTheRangeToWhichItIsRestricted)
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "two 10-20", "three 30-40"}));
 }
 
+TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
+{
+    // The second half of the film goes far behind its end, and no event makes the project end there.
+    host.addPoint(track, standin::Envelope::Curve::Volume, host.inHost(2.0), 0.25F);
+    host.addPoint(track, standin::Envelope::Curve::Volume, host.inHost(18.0), 0.75F);
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:10:00", "01:00:00:00", "01:00:10:00");
+    host.carryOver("01:00:10:00", "01:00:20:00", "01:30:00:00", "01:30:10:00");
+    host.settings().setRestrictRange(true);
+    host.settings().setPreserveMaterial(host.onClock(0.0), host.onClock(10.0));
+
+    host.conform();
+
+    for (const AdaptedHost::Node& point :
+         standin::tests::childrenOf(*host.curveOf(track, standin::Envelope::Curve::Volume)))
+        EXPECT_LT(point->getStart(nullptr), host.inHost(20.0));
+}
+
 TEST_P(HostRunTest, LeavesOutWhatHasNoTimecodes)
 {
     host.carryOver("25:00:00:00", "26:00:00:00", "25:00:00:00", "26:00:00:00");

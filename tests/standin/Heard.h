@@ -18,9 +18,10 @@
 
 namespace standin::tests {
 
-inline const Event& eventOf(const Node& node)
+/// A track, an event or a part as what holds others.
+inline const Container& insideOf(const Node& node)
 {
-    return static_cast<const Event&>(node);
+    return static_cast<const Container&>(node);
 }
 
 /// All times at which something happens on a track: starts and ends at any depth, and points. In seconds of the project.
@@ -29,7 +30,7 @@ inline void collectTimes(const Container& container, std::vector<double>& times)
     for (const Node* child = container.firstChild(); child; child = container.childBehind(*child)) {
         times.push_back(child->absoluteStart());
         times.push_back(child->absoluteEnd());
-        collectTimes(eventOf(*child), times);
+        collectTimes(insideOf(*child), times);
     }
 }
 
@@ -58,7 +59,7 @@ inline void collectSounding(const Container& container, double time, std::vector
             sounding.emplace_back(clip->clip(), clip->name(), clip->sourceOffset() + (time - clip->start()));
         else if (dynamic_cast<const Marker*>(child))
             sounding.emplace_back(nullptr, child->name(), 0.0);
-        collectSounding(eventOf(*child), time - child->start(), sounding);
+        collectSounding(insideOf(*child), time - child->start(), sounding);
     }
 }
 

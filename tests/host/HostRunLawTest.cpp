@@ -1,0 +1,327 @@
+// The law of a run, for random projects and films: where a change event lies, each track holds what stood at the source of
+// the instant, and elsewhere nothing; what is no part of the run stays as it was.
+
+#include "core/DataModel.h"
+#include "core/EventBase.h"
+#include "core/Timecode.h"
+#include "host/Host.h"
+#include "host/TrackRole.h"
+#include "standin/Application.h"
+#include "standin/ProjectManager.h"
+#include "standin/edit/EditService.h"
+#include "standin/file/ProjectFile.h"
+#include "standin/project/Project.h"
+#include "tests/standin/Heard.h"
+#include "tests/standin/RandomProject.h"
+#include "velmark/Attributes.h"
+
+#include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
+
+#include <algorithm>
+#include <cmath>
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace cadrel::host::tests {
+namespace {
+
+using namespace Velmark;
+using core::Timecode;
+using standin::tests::Chance;
+using standin::tests::Heard;
+using util::Result;
+
+using Tracks = std::vector<standin::Track*>;
+
+/// No random film, and nothing that is carried over in it, reaches as far, in seconds of the host.
+constexpr double EndOfFilm = 1000.0;
+
+/// A change event at normal speed, in seconds of the host.
+struct Carried {
+    double source;
+    double destination;
+    double length;
+};
+
+/// A host with a random project, whose model has a random change list.
+class RandomRun {
+public:
+    explicit RandomRun(Chance& chance)
+        : m_chance(chance),
+          project(application.projects().add(standin::tests::randomProject(chance, application.edits().log())))
+    {
+        static constexpr FrameRateInfo Rates[] = {
+            {24.0, 0},
+            {25.0, 0},
+            {24000.0 / 1001.0, FrameRateInfo::Flag::PulledDown},
+            {30000.0 / 1001.0, FrameRateInfo::Flag::PulledDown | FrameRateInfo::Flag::DropFrame}};
+        project.setFrameRate(m_chance.oneOf(Rates));
+        application.activateProject(&project);
+        adapter = makeCounted<Host>(application.context());
+        compose();
+    }
+
+    void conform()
+    {
+        RC_ASSERT(adapter->startCadrel() == Result::Ok);
+        application.idle();
+        RC_ASSERT(isLastEntry(u"Apply Cadrel"));
+    }
+
+    bool isLastEntry(std::u16string_view name) const
+    {
+        const standin::UndoList& entries = project.undoList();
+        return entries.doneCount() == 1 && entries.nameAt(0) == name;
+    }
+
+    core::DataModel& model() { return *adapter->getProjectModel(); }
+
+    std::string bytes() const { return standin::ProjectFile::toText(project); }
+
+    /// Where the material of an instant comes from; nothing where no event lies. Of events that overlap the last wins.
+    std::optional<double> sourceOf(double time) const
+    {
+        for (auto carried = changes.rbegin(); carried != changes.rend(); ++carried) {
+            if (carried->destination <= time && time < carried->destination + carried->length)
+                return time - carried->destination + carried->source;
+        }
+        return std::nullopt;
+    }
+    bool isRestricted() { return model().settings().restrictRange(); }
+    /// Whether the run replaces what stands at the instant.
+    bool isReplaced(double time)
+    {
+        const core::Settings& settings = model().settings();
+        const double onClock = time + project.timeOrigin();
+        return !isRestricted() ||
+               (settings.preserveMaterialBefore() <= onClock && onClock < settings.preserveMaterialAfter());
+    }
+    /// Whether the run takes part in the track.
+    bool isConformed(const standin::Track& track)
+    {
+        return !track.isLocked() && (model().settings().applyTo() == core::ApplyTo::AllTracks || track.selected());
+    }
+
+    /// The tracks that are the user's, and no ruler.
+    Tracks usersTracks() const
+    {
+        Tracks tracks = project.allTracks();
+        int videos = 0;
+        std::erase_if(tracks, [&](standin::Track* track) {
+            using Kind = standin::Track::Kind;
+            // The first two carry the old and the new picture.
+            if (track->kind() == Kind::Video)
+                return ++videos <= 2;
+            return track->isFolder() || track->kind() == Kind::Ruler || hasRole(*track);
+        });
+        return tracks;
+    }
+
+    /// Instants of the project at which nothing begins or ends, before the run or after it.
+    std::vector<double> instants()
+    {
+        const std::vector<double> old = standin::tests::timesOf(project.allTracks());
+        std::vector<double> times = old;
+        for (const Carried& carried : changes) {
+            for (const double time : old)
+                times.push_back(time - carried.source + carried.destination);
+            for (const double time : {carried.destination, carried.destination + carried.length, carried.source,
+                                      carried.source + carried.length})
+                times.push_back(time);
+        }
+        const core::Settings& settings = model().settings();
+        times.push_back(settings.preserveMaterialBefore() - project.timeOrigin());
+        times.push_back(settings.preserveMaterialAfter() - project.timeOrigin());
+        std::erase_if(times, [](double time) { return time < 0.0; });
+        times.push_back(0.0);
+        times.push_back(std::ranges::max(times) + 1.0);
+        return standin::tests::instantsBetween(times);
+    }
+
+private:
+    void compose()
+    {
+        core::Settings& settings = model().settings();
+        settings.setCreateInsertMarkers(false);
+        settings.setCreateDissolveWipeMarkers(false);
+        settings.setCreateAudioSnippetMarkers(false);
+        settings.setCreateAutomationWarningMarkers(false);
+        settings.setCreateOverlapMarkers(false);
+        settings.setCreateDestinationMarkers(m_chance.oneIn(2));
+        if (m_chance.oneIn(3))
+            settings.setApplyTo(core::ApplyTo::SelectedTracks);
+        const double origin = project.timeOrigin();
+        if (m_chance.oneIn(3)) {
+            const double before = static_cast<double>(m_chance.below(80)) - 20.0;
+            settings.setPreserveMaterial(origin + before, origin + before + static_cast<double>(m_chance.below(60)));
+            settings.setRestrictRange(true);
+        }
+        // The frames of a pulled-down clock don't begin with its hours.
+        const core::Framerate rate = Timecode::framerate();
+        const auto firstFrame = static_cast<std::int32_t>(std::ceil(origin * rate.rate));
+        for (std::uint64_t count = 1 + m_chance.below(8); count > 0; --count)
+            carryOver(firstFrame, rate);
+    }
+
+    void carryOver(std::int32_t firstFrame, const core::Framerate& rate)
+    {
+        const auto frames = [&](std::uint64_t seconds) {
+            return static_cast<std::int32_t>(
+                m_chance.below(seconds * static_cast<std::uint64_t>(rate.framesPerSecond)));
+        };
+        const std::int32_t source = firstFrame + frames(100);
+        const std::int32_t destination = firstFrame + frames(100);
+        const std::int32_t length = frames(40);
+        const auto event = std::make_shared<core::EventBase>();
+        event->setRollName("A001");
+        event->setTimecodes(Timecode(source), Timecode(source + length), Timecode(destination),
+                            Timecode(destination + length));
+        model().changeEdl().add(event);
+        const auto inHost = [&](std::int32_t frame) { return Timecode(frame).toSeconds(rate) - project.timeOrigin(); };
+        changes.push_back({inHost(source), inHost(destination), inHost(source + length) - inHost(source)});
+    }
+
+    /// Whether something in the random attributes makes it one of the system's.
+    static bool hasRole(standin::Track& track)
+    {
+        FVariant role;
+        if (track.kind() != standin::Track::Kind::Marker ||
+            track.getAttribute(AttributeKey::MarkerType, role) != ResultOk || !role.isInteger())
+            return false;
+        const std::int64_t kind = role.asInteger() & 0xff;
+        return kind >= TrackRole::Destination && kind <= TrackRole::LastMarker;
+    }
+
+    Chance& m_chance;
+
+public:
+    standin::Application application;
+    standin::Project& project;
+    Counted<Host> adapter;
+    std::vector<Carried> changes;
+};
+
+std::uint64_t someSeed()
+{
+    return *rc::gen::noShrink(rc::gen::resize(rc::kNominalSize, rc::gen::arbitrary<std::uint64_t>()));
+}
+
+bool isLevelFrom(const standin::Envelope& curve, double time)
+{
+    for (const standin::AutomationPoint* point = curve.firstPoint(); point; point = curve.pointBehind(*point)) {
+        if (point->start() >= time && std::abs(point->value() - *curve.valueBehind(time)) > 1e-6)
+            return false;
+    }
+    return true;
+}
+
+/// Nothing to conform is no run; the law says nothing of it.
+bool canRun(RandomRun& run)
+{
+    return run.adapter->canStart() == Result::Ok;
+}
+
+} // namespace
+
+RC_GTEST_PROP(HostRunLaw, EachInstantHoldsWhatStoodAtItsSource, ())
+{
+    standin::tests::SeededChance chance(someSeed());
+    RandomRun run(chance);
+    RC_PRE(canRun(run));
+    const Tracks tracks = run.usersTracks();
+    const std::vector<double> instants = run.instants();
+    // What is expected of each track at each instant; nothing where nothing is to sound.
+    std::vector<std::vector<std::optional<Heard>>> expected;
+    std::vector<bool> isConformed;
+    std::vector<std::vector<double>> times;
+    for (standin::Track* const track : tracks) {
+        isConformed.push_back(run.isConformed(*track));
+        times.push_back(standin::tests::timesOf({track}));
+        auto& ofTrack = expected.emplace_back();
+        for (const double instant : instants) {
+            const bool stays = !isConformed.back() || !run.isReplaced(instant);
+            const std::optional<double> source = stays ? instant : run.sourceOf(instant);
+            ofTrack.push_back(source ? std::optional(Heard::at(*track, *source)) : std::nullopt);
+        }
+    }
+
+    run.conform();
+
+    for (std::size_t index = 0; index < tracks.size(); ++index) {
+        const standin::Track& track = *tracks[index];
+        for (std::size_t at = 0; at < instants.size(); ++at) {
+            const Heard found = Heard::at(track, instants[at]);
+            if (expected[index][at])
+                RC_ASSERT(found == *expected[index][at]);
+            else
+                RC_ASSERT(found.sounding.empty());
+        }
+        if (!isConformed[index])
+            RC_ASSERT(standin::tests::timesOf({tracks[index]}) == times[index]);
+        // Nothing stays behind where the run has worked.
+        RC_ASSERT(track.lastEnd() < EndOfFilm);
+        for (const auto& [number, curve] : track.curves())
+            RC_ASSERT(isLevelFrom(*curve, EndOfFilm));
+    }
+}
+
+RC_GTEST_PROP(HostRunLaw, UndoAndRedoLeadToTheSameBytes, ())
+{
+    standin::tests::SeededChance chance(someSeed());
+    RandomRun run(chance);
+    RC_PRE(canRun(run));
+    const std::string before = run.bytes();
+
+    run.conform();
+    const std::string after = run.bytes();
+
+    RC_ASSERT(run.application.edits().undo(run.project));
+    RC_ASSERT(run.bytes() == before);
+    RC_ASSERT(run.application.edits().redo(run.project));
+    RC_ASSERT(run.bytes() == after);
+}
+
+RC_GTEST_PROP(HostRunLaw, APreviewLeavesTheFilmAsItIs, ())
+{
+    standin::tests::SeededChance chance(someSeed());
+    RandomRun run(chance);
+    RC_PRE(canRun(run));
+    const Tracks tracks = run.usersTracks();
+    const std::vector<double> instants = run.instants();
+    std::vector<std::vector<Heard>> before;
+    for (standin::Track* const track : tracks) {
+        auto& ofTrack = before.emplace_back();
+        for (const double instant : instants)
+            ofTrack.push_back(Heard::at(*track, instant));
+    }
+    const auto expectFilm = [&] {
+        for (std::size_t index = 0; index < tracks.size(); ++index) {
+            for (std::size_t at = 0; at < instants.size(); ++at)
+                RC_ASSERT(Heard::at(*tracks[index], instants[at]).sounding == before[index][at].sounding);
+        }
+    };
+
+    run.adapter->setPreviewActive(true);
+    RC_ASSERT(run.adapter->startPreview(run.model().changeEdl(), 0, 0, 1) == Result::Ok);
+    run.application.idle();
+    RC_ASSERT(run.isLastEntry(u"Preview"));
+    expectFilm();
+    // All that was added stands in the preview, whole.
+    const double preview = run.adapter->getRunState().previewOffset - run.project.timeOrigin();
+    for (standin::Track* const track : tracks) {
+        for (const double time : standin::tests::timesOf({track}))
+            RC_ASSERT(time < EndOfFilm || time >= preview);
+    }
+
+    run.adapter->setPreviewActive(false);
+    expectFilm();
+    for (const standin::Track* const track : tracks)
+        RC_ASSERT(track->lastEnd() < EndOfFilm);
+}
+
+} // namespace cadrel::host::tests
