@@ -1,6 +1,6 @@
 # Each target does all its own set-up: it installs what is missing, configures and builds.
 #
-#   make run            the change EDL of the example reel, into build/run
+#   make run            carries the sound of the example reel over to its new cut, into build/run
 #   make test           every test; PRESET=asan runs them under the sanitizers
 #   make build          the programs into build/release/bin, the libraries into build/release/lib
 #   make bench          the benchmarks, and the whole program against its bounds
@@ -18,8 +18,11 @@ reel3 = examples/reel3
 run:
 	@cmake/build.sh release cadrel
 	@mkdir -p build/run
-	build/release/bin/cadrel generate --old $(reel3)/reel3_v07.edl --new $(reel3)/reel3_v12.edl \
-	    --vfx 'VFX_****_v,_comp' -o build/run/reel3_change.edl --json build/run/reel3_change.json
+	build/release/bin/cadrel apply $(reel3)/reel3.stage --old $(reel3)/reel3_v07.edl --new $(reel3)/reel3_v12.edl \
+	    --vfx 'VFX_****_v,_comp' -o build/run/reel3_v12.stage --json build/run/reel3_v12.json >build/run/reel3_v12.txt
+	@sed '/^$$/q' build/run/reel3_v12.txt
+	@echo "Every move and every marker stands in build/run/reel3_v12.txt, as JSON in build/run/reel3_v12.json."
+	@echo "The project: build/release/bin/cadrel show build/run/reel3_v12.stage"
 
 test:
 	@cmake/build.sh $(PRESET)
@@ -30,8 +33,9 @@ build:
 	@cmake/build.sh $(PRESET)
 
 bench:
-	@cmake/build.sh release cadrel cadrel_bench cadrel_bench_program
+	@cmake/build.sh release cadrel cadrel_bench cadrel_bench_host cadrel_bench_program
 	build/release/bin/cadrel_bench
+	build/release/bin/cadrel_bench_host
 	build/release/bin/cadrel_bench_program build/release/bin/cadrel build/bench
 
 fuzz:

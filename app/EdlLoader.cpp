@@ -141,8 +141,7 @@ void EdlLoader::checkRate(const LoadedEdl& edl) const
         faster
             ? "shows " + std::to_string(edl.shown.framesPerSecond) + " fps, more than the " + label + " of the project"
             : counted(edl.events.countInvalidTimecodes(), "event") + " with timecodes that don't exist at " + label;
-    const Failure failure{edl.path, where.empty() ? what : what + ", first in " + where,
-                          "check the file or give another --rate"};
+    const Failure failure{edl.path, where.empty() ? what : what + ", first in " + where, options_.rateAdvice};
     if (options_.strict)
         throw failure;
     terminal_.warn(failure);

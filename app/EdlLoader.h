@@ -16,6 +16,8 @@ struct LoadOptions {
     bool renameBRolls = true; ///< "A001B" is "A001" where the file holds that too
     bool acceptAudio = false; ///< events of audio channels are no flaw
     bool strict = false;      ///< a warning is a failure
+    /// What the user can do about a file that doesn't fit the rate.
+    std::string rateAdvice = "check the file or give another --rate";
 };
 
 struct LoadedEdl {

@@ -42,6 +42,11 @@ Interruption::~Interruption()
         std::raise(requested);
 }
 
+const volatile std::sig_atomic_t* Interruption::request()
+{
+    return &requested;
+}
+
 void Interruption::check()
 {
     if (requested != 0)

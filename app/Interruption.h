@@ -16,6 +16,8 @@ public:
     Interruption& operator=(const Interruption&) = delete;
     ~Interruption();
 
+    /// Nonzero from when the user wants to end.
+    static const volatile std::sig_atomic_t* request();
     /// Throws Requested when the user wants to end.
     static void check();
 

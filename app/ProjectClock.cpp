@@ -2,7 +2,7 @@
 
 #include "app/ProjectFramerate.h"
 #include "core/Timecode.h"
-#include "util/Result.h"
+#include "host/HostFramerate.h"
 
 #include <array>
 #include <cmath>
@@ -11,9 +11,7 @@
 
 namespace cadrel::app {
 
-using core::Framerate;
 using core::Timecode;
-using Flag = Velmark::FrameRateInfo::Flag;
 
 namespace {
 
@@ -24,22 +22,10 @@ std::string signOf(double frame)
     return frame < 0.0 ? "-" : "";
 }
 
-Framerate toFramerate(const Velmark::FrameRateInfo& info)
-{
-    constexpr double Fastest = 1000.0;
-    if (!(info.framesPerSecond >= 1.0 && info.framesPerSecond <= Fastest))
-        throw util::Result::NotSupported;
-    Framerate framerate(static_cast<std::int32_t>(std::lround(info.framesPerSecond)),
-                        (info.flags & Flag::DropFrame) != 0 ? 1 : 0);
-    framerate.rate = info.framesPerSecond;
-    framerate.pulledDown = (info.flags & Flag::PulledDown) != 0;
-    return framerate;
-}
-
 } // namespace
 
 ProjectClock::ProjectClock(const Velmark::FrameRateInfo& rate, double origin)
-    : framerate_(toFramerate(rate)), origin_(origin)
+    : framerate_(host::framerateOf(rate)), origin_(origin)
 {
 }
 

@@ -1,6 +1,10 @@
 #include "app/ProjectContent.h"
 
+#include "app/Printable.h"
+#include "standin/file/Utf16.h"
+
 #include <algorithm>
+#include <string_view>
 
 namespace cadrel::app {
 
@@ -57,6 +61,17 @@ const char* kindOf(const standin::Event& event)
     if (const auto* marker = dynamic_cast<const standin::Marker*>(&event))
         return marker->isRange() ? "range" : "marker";
     return "clip";
+}
+
+std::string printableName(const std::u16string& name, std::size_t mostCharacters)
+{
+    if (name.empty())
+        return "(no name)";
+    // A character has two units at most, so that what isn't converted isn't shown either.
+    std::u16string_view start = std::u16string_view(name).substr(0, 2 * (mostCharacters + 1));
+    const bool endsInHalf = start.back() >= 0xd800 && start.back() <= 0xdbff;
+    start.remove_suffix(endsInHalf ? 1 : 0);
+    return toPrintable(standin::toUtf8(start), mostCharacters).text;
 }
 
 std::string nameOfCurve(std::int32_t number)

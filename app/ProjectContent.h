@@ -43,6 +43,14 @@ ContentCount countContent(const standin::Track& track);
 /// "clip", "part", "marker" or "range".
 const char* kindOf(const standin::Event& event);
 
+/// Longer names are cut, so that one of them doesn't push the rest off the screen.
+inline constexpr std::size_t MostCharactersOfAName = 40;
+/// Behind the name of a marker there is nothing, and it is often a sentence.
+inline constexpr std::size_t MostCharactersOfAMarker = 120;
+
+/// The name of a node as a terminal may get it; "(no name)" for none.
+std::string printableName(const std::u16string& name, std::size_t mostCharacters = MostCharactersOfAName);
+
 /// The name of a curve, or its number when it has none.
 std::string nameOfCurve(std::int32_t number);
 

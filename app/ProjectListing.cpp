@@ -25,10 +25,6 @@ using standin::Track;
 
 namespace {
 
-/// Longer names are cut, so that one of them doesn't push the rest off the screen.
-constexpr std::size_t MostCharactersOfAName = 40;
-/// Behind the name of a marker there is nothing, and it is often a sentence.
-constexpr std::size_t MostCharactersOfAMarker = 120;
 constexpr std::size_t MostCharactersOfAValue = 120;
 /// What lies deeper is shown at the same place.
 constexpr std::size_t DeepestIndentation = 8;
@@ -57,17 +53,6 @@ bool isMarker(const Event& event)
 std::string indentation(std::size_t depth)
 {
     return std::string(2 * std::min(depth, DeepestIndentation), ' ');
-}
-
-std::string shown(const std::u16string& name, std::size_t mostCharacters = MostCharactersOfAName)
-{
-    if (name.empty())
-        return "(no name)";
-    // A character has two units at most, so that what isn't converted isn't shown either.
-    std::u16string_view start = std::u16string_view(name).substr(0, 2 * (mostCharacters + 1));
-    const bool endsInHalf = start.back() >= 0xd800 && start.back() <= 0xdbff;
-    start.remove_suffix(endsInHalf ? 1 : 0);
-    return toPrintable(toUtf8(start), mostCharacters).text;
 }
 
 std::string textOf(const Attribute& attribute)
@@ -167,7 +152,7 @@ void ProjectListing::printFacts(std::ostream& out, const std::string& fileName) 
 
     out << "Project      " << toPrintable(fileName).text << '\n';
     if (!project_.name().empty())
-        out << "Name         " << shown(project_.name()) << '\n';
+        out << "Name         " << printableName(project_.name()) << '\n';
     out << "Frame rate   " << clock_.rateInWords() << '\n';
     out << "Time origin  " << clock_.exactTimecode(0.0) << '\n';
     out << "End          " << clock_.exactTimecode(project_.getEnd(nullptr)) << ", content to "
@@ -191,9 +176,9 @@ void ProjectListing::printTree(std::ostream& out) const
     const Tracks tracks = tracksOf(project_);
     const auto rowOf = [](const Track& track) {
         const std::size_t events = countContent(track).events();
-        return Columns::Row{indentation(foldersAround(track).size()) + shown(track.name()), Track::wordOf(track.kind()),
-                            stateOf(track, "locked", "selected"), events == 0 ? std::string() : std::to_string(events),
-                            automationOf(track)};
+        return Columns::Row{indentation(foldersAround(track).size()) + printableName(track.name()),
+                            Track::wordOf(track.kind()), stateOf(track, "locked", "selected"),
+                            events == 0 ? std::string() : std::to_string(events), automationOf(track)};
     };
     Columns columns({"track", "kind", "state", "events", "automation"}, {3});
     for (const Track* track : tracks)
@@ -237,11 +222,11 @@ void ProjectListing::printHeading(std::ostream& out, const Track& track) const
 {
     std::vector<std::string> facts{Track::wordOf(track.kind())};
     for (const Track* folder : foldersAround(track))
-        facts.push_back(std::string("in ") + shown(folder->name()));
+        facts.push_back(std::string("in ") + printableName(folder->name()));
     const std::string state = stateOf(track, inColour(Red, "locked"), inColour(Green, "selected"));
     if (!state.empty())
         facts.push_back(state);
-    out << inColour(Bold, shown(track.name())) << " (" << joined(facts) << ")\n";
+    out << inColour(Bold, printableName(track.name())) << " (" << joined(facts) << ")\n";
     for (const std::string& attribute : attributesOf(track))
         out << "  " << attribute << '\n';
 }
@@ -291,7 +276,7 @@ void ProjectListing::printCurve(std::ostream& out, standin::Envelope& curve) con
 void ProjectListing::printPool(std::ostream& out) const
 {
     const auto rowOf = [this](const MediaClip& clip) {
-        return Columns::Row{shown(clip.name()),
+        return Columns::Row{printableName(clip.name()),
                             clip.kind() == MediaClip::Kind::Video ? Velmark::TypeWord::Video : Velmark::TypeWord::Audio,
                             clock_.exactLength(clip.seconds()), toPrintable(toUtf8(clip.path())).text};
     };
@@ -312,11 +297,11 @@ Columns::Row ProjectListing::rowOf(const PlacedEvent& placed) const
                      clock_.exactTimecode(placed.start),
                      isInstant ? "" : clock_.exactTimecode(placed.end),
                      isInstant ? "" : clock_.exactLength(event.length()),
-                     shown(event.name(), isMarker(event) ? MostCharactersOfAMarker : MostCharactersOfAName),
+                     printableName(event.name(), isMarker(event) ? MostCharactersOfAMarker : MostCharactersOfAName),
                      "",
                      ""};
     if (clipEvent) {
-        row[ClipColumn] = clipEvent->clip() ? shown(clipEvent->clip()->name()) : "(no clip)";
+        row[ClipColumn] = clipEvent->clip() ? printableName(clipEvent->clip()->name()) : "(no clip)";
         row[SourceColumn] = clock_.exactLength(clipEvent->sourceOffset());
     }
     return row;

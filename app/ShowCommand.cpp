@@ -5,6 +5,7 @@
 #include "app/JsonOutput.h"
 #include "app/Paths.h"
 #include "app/Printable.h"
+#include "app/ProjectAccess.h"
 #include "app/ProjectClock.h"
 #include "app/ProjectContent.h"
 #include "app/ProjectJson.h"
@@ -14,17 +15,13 @@
 #include "standin/file/ProjectFile.h"
 #include "standin/file/Utf16.h"
 #include "standin/project/Project.h"
-#include "util/Result.h"
 
 #include <algorithm>
 #include <cstddef>
-#include <filesystem>
 #include <iostream>
 #include <iterator>
 #include <optional>
 #include <string_view>
-#include <system_error>
-#include <unistd.h>
 #include <vector>
 
 namespace cadrel::app {
@@ -41,40 +38,20 @@ namespace {
 constexpr std::size_t MostNamesInAMessage = 40;
 constexpr std::size_t MostCharactersOfAName = 40;
 
-/// The fault alone: the error begins with the name of the file, in as many bytes, as the failure does.
-std::string faultIn(const ProjectFileError& error, const std::string& file)
-{
-    const std::string text = error.what();
-    const bool hasName = text.size() > file.size() && text.compare(file.size(), 2, ": ") == 0;
-    return hasName ? text.substr(file.size() + 2) : text;
-}
-
 Project& read(const std::string& file, Terminal& terminal)
 {
     // A long project is taken apart node by node; the end of the program does it at once.
     static standin::ChangeLog& log = *new standin::ChangeLog;
     static Project* project = nullptr;
 
-    toWide(file);
-    std::error_code ignored;
-    if (!std::filesystem::is_regular_file(file, ignored) || access(file.c_str(), R_OK) != 0)
-        throw unreadable(file, FileKind::Project);
+    requireReadableProject(file);
     terminal.showProgress("reading " + fileNameOf(file));
     try {
         project = ProjectFile::read(file, log).detach();
     } catch (const ProjectFileError& error) {
-        throw Failure{file, faultIn(error, file), "take an intact copy, or the version of Cadrel that wrote it"};
+        throw readingFailure(error, file);
     }
     return *project;
-}
-
-ProjectClock clockOf(Project& project, const std::string& file)
-{
-    try {
-        return {project.frameRate(), project.timeOrigin()};
-    } catch (const util::Result::Type&) {
-        throw Failure{file, "has a frame rate at which no timecode counts", "correct the rate"};
-    }
 }
 
 bool isNamed(const Track& track, const std::string& name)

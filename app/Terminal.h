@@ -15,6 +15,8 @@ public:
     Terminal& operator=(const Terminal&) = delete;
     ~Terminal();
 
+    /// Whether there is one to show it on.
+    bool showsProgress() const { return showsProgress_; }
     /// Shows what is being done, on a terminal only.
     void showProgress(const std::string& what);
     void clearProgress();

@@ -31,8 +31,11 @@ TEST(CommandLine, VersionIsPrinted)
 
 TEST(CommandLine, HelpOfEachCommandHasAnExample)
 {
-    for (const std::vector<std::string>& arguments :
-         {std::vector<std::string>{"--help"}, {"generate", "--help"}, {"list", "--help"}, {"show", "--help"}}) {
+    for (const std::vector<std::string>& arguments : {std::vector<std::string>{"--help"},
+                                                      {"generate", "--help"},
+                                                      {"apply", "--help"},
+                                                      {"list", "--help"},
+                                                      {"show", "--help"}}) {
         const Outcome outcome = runCadrel(arguments);
 
         EXPECT_EQ(outcome.status, 0);
@@ -43,7 +46,7 @@ TEST(CommandLine, HelpOfEachCommandHasAnExample)
 
 TEST(CommandLine, ACommandIsNeeded)
 {
-    expectWrongUsage({}, "generate, list or show");
+    expectWrongUsage({}, "generate, apply, list or show");
     expectWrongUsage({"conform"}, "conform");
 }
 

@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <fcntl.h>
 #include <fstream>
+#include <functional>
 #include <sched.h>
 #include <spawn.h>
 #include <stdexcept>
@@ -87,6 +88,31 @@ Outcome run(const std::vector<std::string>& words, const std::string& outPath)
     return {status, outPath.empty() ? contentOf(out) : std::string(), contentOf(err)};
 }
 
+/// `whenShown` is called with all that the program has shown so far, whenever that has become more.
+Outcome runOnTerminal(const std::vector<std::string>& arguments, const std::string& environment,
+                      const std::function<void(pid_t child, const std::string& shown)>& whenShown)
+{
+    const int terminal = posix_openpt(O_RDWR | O_NOCTTY);
+    if (terminal < 0 || grantpt(terminal) != 0 || unlockpt(terminal) != 0)
+        throw std::runtime_error("no terminal");
+    Outputs outputs;
+    outputs.open(STDOUT_FILENO, ptsname(terminal));
+    outputs.open(STDERR_FILENO, ptsname(terminal));
+    std::vector<std::string> variables{"TERM=xterm", environment};
+
+    const pid_t child = start(commandLine(CADREL_PROGRAM, arguments), outputs, pointersTo(variables).data());
+    std::string shown;
+    std::array<char, 4096> part{};
+    // The reading fails once the program has closed its side.
+    for (ssize_t count = 0; (count = read(terminal, part.data(), part.size())) > 0;) {
+        shown.append(part.data(), static_cast<std::size_t>(count));
+        whenShown(child, shown);
+    }
+    close(terminal);
+
+    return {exitStatusOf(child), shown, {}};
+}
+
 constexpr uid_t Nobody = 65534;
 
 bool isRoot()
@@ -152,23 +178,18 @@ void giveToUnprivileged(const std::filesystem::path& path)
 
 Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std::string& environment)
 {
-    const int terminal = posix_openpt(O_RDWR | O_NOCTTY);
-    if (terminal < 0 || grantpt(terminal) != 0 || unlockpt(terminal) != 0)
-        throw std::runtime_error("no terminal");
-    Outputs outputs;
-    outputs.open(STDOUT_FILENO, ptsname(terminal));
-    outputs.open(STDERR_FILENO, ptsname(terminal));
-    std::vector<std::string> variables{"TERM=xterm", environment};
+    return runOnTerminal(arguments, environment, [](pid_t, const std::string&) {});
+}
 
-    const pid_t child = start(commandLine(CADREL_PROGRAM, arguments), outputs, pointersTo(variables).data());
-    std::string shown;
-    std::array<char, 4096> part{};
-    // The reading fails once the program has closed its side.
-    for (ssize_t count = 0; (count = read(terminal, part.data(), part.size())) > 0;)
-        shown.append(part.data(), static_cast<std::size_t>(count));
-    close(terminal);
-
-    return {exitStatusOf(child), shown, {}};
+Outcome runCadrelInterruptedAt(const std::string& text, const std::vector<std::string>& arguments)
+{
+    bool isInterrupted = false;
+    return runOnTerminal(arguments, {}, [&](pid_t child, const std::string& shown) {
+        if (isInterrupted || shown.find(text) == std::string::npos)
+            return;
+        kill(child, SIGINT);
+        isInterrupted = true;
+    });
 }
 
 } // namespace cadrel::tests

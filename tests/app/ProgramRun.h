@@ -32,5 +32,7 @@ void giveToUnprivileged(const std::filesystem::path& path);
 /// Runs `cadrel` with both outputs on a terminal; what it showed stands in `out`. `environment` is added to what is
 /// set for the run, such as "NO_COLOR=1".
 Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std::string& environment = {});
+/// Likewise, and interrupts it, as Ctrl-C does, as soon as it shows the text.
+Outcome runCadrelInterruptedAt(const std::string& text, const std::vector<std::string>& arguments);
 
 } // namespace cadrel::tests

@@ -1,0 +1,26 @@
+#pragma once
+
+#include "app/ApplyCommand.h"
+#include "app/GenerateCommand.h"
+#include "app/ListCommand.h"
+#include "app/ShowCommand.h"
+
+#include <optional>
+
+namespace cadrel::app {
+
+/// The command line, once parsed.
+struct CommandLine {
+    enum class Command { Generate, Apply, List, Show };
+
+    GenerateOptions generate;
+    ApplyOptions apply;
+    ListOptions list;
+    ShowOptions show;
+    Command command = Command::Generate;
+
+    /// Prints what `--help` and `--version` ask for, and gives nothing then. Throws UsageError.
+    static std::optional<CommandLine> parse(int argc, char** argv);
+};
+
+} // namespace cadrel::app

@@ -1,0 +1,47 @@
+#pragma once
+
+#include "standin/Application.h"
+#include "velmark/Counted.h"
+
+#include <string>
+
+namespace cadrel::core {
+class DataModel;
+} // namespace cadrel::core
+
+namespace cadrel::host {
+class Host;
+} // namespace cadrel::host
+
+namespace cadrel::app {
+
+class Terminal;
+
+/// A project that is open in the stand-in host, with the system at work there as in any host: it gets the host's context,
+/// is told of the project, and its run is requested as the window does it and done on the host's next idle call.
+class HostedProject {
+public:
+    /// Throws Failure when the file can't be read. The terminal shows the progress of a run.
+    HostedProject(const std::string& file, const Terminal& terminal);
+    HostedProject(const HostedProject&) = delete;
+    HostedProject& operator=(const HostedProject&) = delete;
+    ~HostedProject();
+
+    standin::Project& project() { return *project_; }
+    core::DataModel& model();
+
+    /// Applies the change list of the model. An Interruption cancels it, and what has been done is taken back. Throws
+    /// Interruption::Requested then, and Failure when the run couldn't begin or broke off.
+    void apply();
+
+    /// The host's own save, in which the model is stored with the project. Throws Failure.
+    void save(const std::string& file);
+
+private:
+    std::string file_;
+    standin::Application application_;
+    Velmark::Counted<host::Host> host_;
+    standin::Project* project_ = nullptr;
+};
+
+} // namespace cadrel::app

@@ -1,0 +1,920 @@
+#include "tests/app/Film.h"
+#include "tests/app/ProgramRun.h"
+#include "tests/app/SoundProject.h"
+
+#include <algorithm>
+#include <array>
+#include <cstddef>
+#include <cstdio>
+#include <filesystem>
+#include <gtest/gtest.h>
+#include <map>
+#include <nlohmann/json.hpp>
+#include <stdexcept>
+#include <string_view>
+
+namespace {
+
+using namespace cadrel::tests;
+using nlohmann::json;
+
+using Words = std::vector<std::string>;
+/// By the names of the clips: where the pieces of each lie, as "in-out", or "in-out from" behind the start of its file.
+using Places = std::map<std::string, Words>;
+
+/// Where 01:00:00:00 stands in the project: at its very start, or an hour behind.
+enum class Origin { AtTheFilm, AtMidnight };
+constexpr std::array Origins{Origin::AtTheFilm, Origin::AtMidnight};
+
+std::string number(double value)
+{
+    std::array<char, 32> text{};
+    std::snprintf(text.data(), text.size(), "%.17g", value);
+    return text.data();
+}
+
+/// The sound of the film of Film.h as it fits the old cut, its times in seconds behind 01:00:00:00. TWO has lost 10 to 12, and
+/// four seconds have come in before THREE:
+///
+///     old cut   0--- ONE ---10----- TWO ----20----- THREE ----30
+///                |       |   \xx\      \      \           |
+///     new cut   0--- ONE ---10-- TWO --18-- NEW --22----- THREE ----32
+class Scene {
+public:
+    explicit Scene(Origin origin = Origin::AtTheFilm)
+        : oldFile(folder.write("old.edl", oldCut())), newFile(folder.write("new.edl", newCut())),
+          film_(origin == Origin::AtTheFilm ? 0.0 : 3600.0)
+    {
+        project = folder.write("scene.stage", text());
+    }
+
+    Words arguments(const Words& more = {}) const
+    {
+        Words words{"apply", project, "--old", oldFile, "--new", newFile};
+        words.insert(words.end(), more.begin(), more.end());
+        return words;
+    }
+    Outcome apply(const Words& more = {}) const { return runCadrel(arguments(more)); }
+    json applyAsJson(Words more = {}) const
+    {
+        more.insert(more.end(), {"--json", "-"});
+        const Outcome outcome = apply(more);
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return json::parse(outcome.out);
+    }
+
+    const TempFolder folder;
+    const std::string oldFile;
+    const std::string newFile;
+    std::string project;
+
+private:
+    std::string at(double seconds) const { return number(film_ + seconds); }
+    std::string clip(const std::string& name, double start, double end, int file = 1) const
+    {
+        return R"({"kind": "clip", "start": )" + at(start) + R"(, "end": )" + at(end) + R"(, "clip": )" +
+               std::to_string(file) + R"(, "name": ")" + name + R"("})";
+    }
+    std::string memo(const std::string& name, double start) const
+    {
+        return R"({"kind": "point", "start": )" + at(start) + R"(, "name": ")" + name + R"("})";
+    }
+    std::string text() const
+    {
+        return R"({"format": "stage", "version": 1, "framesPerSecond": 24, "dropFrame": false, "pulledDown": false,
+          "timeOrigin": )" +
+               number(3600.0 - film_) + R"(, "end": )" + at(60) + R"(, "position": 0, "leftLocator": 0,
+          "rightLocator": 0, "cycleStart": 0, "cycleEnd": 0,
+          "pool": [
+            {"number": 1, "kind": "audio", "name": "boom", "path": "boom.wav", "length": 100},
+            {"number": 2, "kind": "audio", "name": "step", "path": "step.wav", "length": 10}
+          ],
+          "tracks": [
+            {"kind": "folder", "name": "Dialogue", "tracks": [
+              {"kind": "audio", "name": "DIA", "selected": true,
+               "curves": [{"number": 1, "automates": "volume", "points": [{"time": )" +
+               at(13) + R"(, "value": 0.25}, {"time": )" + at(16) + R"(, "value": 0.75}]}],
+               "events": [)" +
+               clip("hello", 1, 4) + "," + clip("long line", 8, 14) + "," + clip("lost line", 10.5, 11.5) + "," +
+               clip("answer", 13, 16) + "," + clip("over the cut", 18, 21) + "," + clip("goodbye", 24, 26) +
+               R"(]}
+            ]},
+            {"kind": "audio", "name": "FX", "events": [)" +
+               clip("step", 12.5, 13, 2) + "," + clip("step", 14.5, 15, 2) + R"(,
+              {"kind": "part", "name": "door", "start": )" +
+               at(24) + R"(, "end": )" + at(28) + R"(, "events": [
+                {"kind": "clip", "start": 1, "end": 2, "clip": 2, "name": "latch"}]}]},
+            {"kind": "audio", "name": "Guide", "locked": true, "events": [)" +
+               clip("guide", 0, 30) + R"(]},
+            {"kind": "marker", "name": "Memos", "attributes": {"Cadrel:MarkerType": 7}, "events": [)" +
+               memo("too soft", 2) + "," + memo("cut it?", 11) + "," + memo("again", 13) + R"(]}
+          ]})";
+    }
+
+    double film_;
+};
+
+/// Seconds behind 01:00:00:00 of a timecode of that hour, at 24 frames a second.
+double secondsOf(const json& time)
+{
+    const auto timecode = time.at("timecode").get<std::string>();
+    return 60 * std::stoi(timecode.substr(3, 2)) + std::stoi(timecode.substr(6, 2)) +
+           std::stoi(timecode.substr(9, 2)) / 24.0 + 3600.0 * (std::stoi(timecode.substr(0, 2)) - 1);
+}
+
+std::string brief(double seconds)
+{
+    std::array<char, 32> text{};
+    std::snprintf(text.data(), text.size(), "%g", seconds);
+    return text.data();
+}
+
+std::string spanOf(const json& start, const json& end)
+{
+    return brief(secondsOf(start)) + "-" + brief(secondsOf(end));
+}
+
+void addPlaces(const json& events, Places& places)
+{
+    for (const json& event : events) {
+        if (event.contains("events")) {
+            addPlaces(event.at("events"), places);
+            continue;
+        }
+        std::string place = spanOf(event.at("start"), event.at("end"));
+        if (event.contains("sourceOffset") && event.at("sourceOffset").at("seconds") != 0.0)
+            place += " from " + brief(event.at("sourceOffset").at("seconds").get<double>());
+        places[event.at("name")].push_back(place);
+    }
+}
+
+json show(const std::filesystem::path& project)
+{
+    const Outcome outcome = runCadrel({"show", project, "--json", "-"});
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    return json::parse(outcome.out);
+}
+
+const json& named(const json& list, const std::string& name)
+{
+    const auto found = std::find_if(list.begin(), list.end(), [&](const json& entry) { return entry["name"] == name; });
+    if (found == list.end())
+        throw std::runtime_error("there is no " + name);
+    return *found;
+}
+
+/// What lies on a track of a project file.
+Places placesOn(const std::string& track, const std::filesystem::path& project)
+{
+    Places places;
+    addPlaces(named(show(project).at("tracks"), track).at("events"), places);
+    return places;
+}
+
+/// "was -> now, now" for all that a report tells of a track, with "nothing" for what is in no cut.
+Words changesOf(const json& report, const std::string& track)
+{
+    Words changes;
+    for (const json& change : named(report.at("tracks"), track).at("changes")) {
+        std::string now;
+        for (const json& piece : change.at("now"))
+            now += (now.empty() ? "" : ", ") + spanOf(piece.at("in"), piece.at("out"));
+        changes.push_back(change.at("name").get<std::string>() + ": " +
+                          spanOf(change.at("was").at("in"), change.at("was").at("out")) + " -> " +
+                          (now.empty() ? "nothing" : now));
+    }
+    return changes;
+}
+
+/// "in-out name" of the markers of a kind.
+Words markersOf(const json& report, const std::string& kind)
+{
+    Words markers;
+    for (const json& marker : report.at("markers")) {
+        if (marker.at("kind") == kind)
+            markers.push_back(spanOf(marker.at("in"), marker.at("out")) + " " + marker.at("name").get<std::string>());
+    }
+    return markers;
+}
+
+/// Without the time that the run took, the only thing that isn't the same every time.
+std::string withoutTime(std::string text)
+{
+    const std::size_t start = text.find(" in ", text.find("Applied"));
+    return text.erase(start, text.find('\n', start) - start);
+}
+
+/// Whether a piece stands somewhere in the text.
+bool tells(const std::string& text, std::string_view piece)
+{
+    return text.find(piece) != std::string::npos;
+}
+
+TEST(Apply, MaterialGoesWhereItsPictureHasGone)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+        const auto result = scene.folder / "result.stage";
+
+        const Outcome outcome = scene.apply({"-o", result});
+
+        EXPECT_EQ(outcome.status, 0);
+        EXPECT_EQ(outcome.err, "");
+        EXPECT_EQ(placesOn("DIA", result), (Places{{"hello", {"1-4"}},
+                                                   {"long line", {"8-10", "10-12 from 4"}},
+                                                   {"answer", {"11-14"}},
+                                                   {"over the cut", {"16-18", "22-23 from 2"}},
+                                                   {"goodbye", {"26-28"}}}));
+        EXPECT_EQ(placesOn("FX", result), (Places{{"step", {"10.5-11", "12.5-13"}}, {"latch", {"27-28"}}}));
+        EXPECT_EQ(placesOn("Guide", result), (Places{{"guide", {"0-30"}}}));
+        EXPECT_EQ(placesOn("Memos", result), (Places{{"too soft", {"2-2"}}, {"again", {"11-11"}}}));
+    }
+}
+
+TEST(Apply, TheAutomationGoesAlong)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+        const auto result = scene.folder / "result.stage";
+
+        ASSERT_EQ(scene.apply({"-o", result}).status, 0);
+
+        const json shown = show(result);
+        std::map<double, double> points;
+        for (const json& point : named(shown.at("tracks"), "DIA").at("automation").at(0).at("points"))
+            points[secondsOf(point)] = point.at("value");
+        EXPECT_DOUBLE_EQ(points.at(11), 0.25);
+        EXPECT_DOUBLE_EQ(points.at(14), 0.75);
+    }
+}
+
+TEST(Apply, TheReportTellsWhatBecameOfEachClip)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+
+        const json report = scene.applyAsJson();
+
+        EXPECT_EQ(changesOf(report, "DIA"),
+                  (Words{"long line: 8-14 -> 8-10, 10-12", "lost line: 10.5-11.5 -> nothing", "answer: 13-16 -> 11-14",
+                         "over the cut: 18-21 -> 16-18, 22-23", "goodbye: 24-26 -> 26-28"}));
+        EXPECT_EQ(changesOf(report, "FX"),
+                  (Words{"step: 12.5-13 -> 10.5-11", "step: 14.5-15 -> 12.5-13", "latch: 25-26 -> 27-28"}));
+        EXPECT_EQ(changesOf(report, "Guide"), Words());
+        EXPECT_EQ(changesOf(report, "Memos"), (Words{"cut it?: 11-11 -> nothing", "again: 13-13 -> 11-11"}));
+    }
+}
+
+TEST(Apply, TheReportTellsHowEachClipHasChanged)
+{
+    const Scene scene;
+
+    const json changes = named(scene.applyAsJson().at("tracks"), "DIA").at("changes");
+
+    const json& longLine = named(changes, "long line");
+    EXPECT_TRUE(longLine.at("moved"));
+    EXPECT_TRUE(longLine.at("split"));
+    EXPECT_FALSE(longLine.at("doubled"));
+    EXPECT_EQ(longLine.at("trimmed").at("middle").at("timecode"), "00:00:02:00");
+    EXPECT_EQ(longLine.at("trimmed").at("start").at("seconds"), 0.0);
+    EXPECT_EQ(longLine.at("clip"), "boom");
+    EXPECT_EQ(longLine.at("now").at(1).at("shift").at("timecode"), "-00:00:02:00");
+    const json& lostLine = named(changes, "lost line");
+    EXPECT_FALSE(lostLine.at("moved"));
+    EXPECT_EQ(lostLine.at("now"), json::array());
+}
+
+TEST(Apply, ThePageForPeople)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+
+        const Outcome outcome = scene.apply();
+
+        EXPECT_EQ(outcome.status, 0);
+        EXPECT_EQ(withoutTime(outcome.out),
+                  R"(Project     scene.stage
+Old cut     old.edl: 3 events, all valid
+New cut     new.edl: 4 events, all valid
+Frame rate  24 fps, as the project has it
+Change EDL  3 events
+Covered     00:00:28:00 of 00:00:32:00, 87.5 %
+Applied     3 events
+Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 in no cut
+Own markers 3: 1 stay, 1 moved, 1 in no cut
+New markers 3 Destination, 1 Insert
+Written     no project; give -o PROJECT.stage or --in-place
+
+track                              holds  stay  moved  trimmed  split  doubled  in no cut  new
+DIA (audio, in Dialogue)               6     1      4        1      2                   1
+FX (audio)                             3            3
+Guide (audio, locked)                  1     1
+Memos (marker, in Cadrel Markers)      3     1      1                                   1
+
+DIA (audio, in Dialogue)
+  was in       was out      now in       now out      shift         clip or marker   became
+  01:00:08:00  01:00:14:00  01:00:08:00  01:00:10:00                long line        moved, trimmed by 00:00:02:00 in the middle, split
+                            01:00:10:00  01:00:12:00  -00:00:02:00  long line
+  01:00:10:12  01:00:11:12                                          lost line        in no cut
+  01:00:13:00  01:00:16:00  01:00:11:00  01:00:14:00  -00:00:02:00  answer           moved
+  01:00:18:00  01:00:21:00  01:00:16:00  01:00:18:00  -00:00:02:00  over the cut     moved, split
+                            01:00:22:00  01:00:23:00  +00:00:02:00  over the cut
+  01:00:24:00  01:00:26:00  01:00:26:00  01:00:28:00  +00:00:02:00  goodbye          moved
+
+FX (audio)
+  was in       was out      now in       now out      shift         clip or marker   became
+  01:00:12:12  01:00:13:00  01:00:10:12  01:00:11:00  -00:00:02:00  step             moved
+  01:00:14:12  01:00:15:00  01:00:12:12  01:00:13:00  -00:00:02:00  step             moved
+  01:00:25:00  01:00:26:00  01:00:27:00  01:00:28:00  +00:00:02:00  latch (in door)  moved
+
+Memos (marker, in Cadrel Markers)
+  was in       was out      now in       now out      shift         clip or marker   became
+  01:00:11:00                                                       cut it?          in no cut
+  01:00:13:00               01:00:11:00               -00:00:02:00  again            moved
+
+Destination, 3 markers
+  in           out          length       marker
+  01:00:00:00  01:00:10:00  00:00:10:00  Event: 1 - A001
+  01:00:10:00  01:00:18:00  00:00:08:00  Event: 2 - A002
+  01:00:22:00  01:00:32:00  00:00:10:00  Event: 3 - A003
+
+Insert, 1 marker
+  in           out          length       marker
+  01:00:18:00  01:00:22:00  00:00:04:00  Insert: B009
+)");
+    }
+}
+
+TEST(Apply, TheSummaryIsTheFirstParagraph)
+{
+    const Scene scene;
+
+    const std::string whole = withoutTime(scene.apply().out);
+
+    EXPECT_EQ(withoutTime(scene.apply({"--summary"}).out), whole.substr(0, whole.find("\n\n") + 1));
+}
+
+TEST(Apply, TheReportHasTheEventsAndWhatTheCutsHold)
+{
+    const Scene scene;
+
+    const json report = scene.applyAsJson();
+
+    EXPECT_EQ(report.at("project"), "scene.stage");
+    EXPECT_EQ(report.at("rate"), "24 fps");
+    EXPECT_EQ(report.at("old"), (json{{"files", {"old.edl"}}, {"events", 3}, {"invalid", 0}}));
+    EXPECT_EQ(report.at("events").size(), 3U);
+    EXPECT_EQ(report.at("applied"), 3);
+    EXPECT_EQ(report.at("passedOver"), json::array());
+    EXPECT_EQ(report.at("inserts").at(0).at("dstIn"), "01:00:18:00");
+    EXPECT_EQ(report.at("written"), json());
+    EXPECT_GE(report.at("seconds").get<double>(), 0.0);
+}
+
+TEST(Apply, WithoutAnOutputNothingIsWritten)
+{
+    const Scene scene;
+    const std::string before = contentOf(scene.project);
+
+    EXPECT_EQ(scene.apply().status, 0);
+
+    EXPECT_EQ(contentOf(scene.project), before);
+    EXPECT_EQ(scene.folder.names(), (Words{"new.edl", "old.edl", "scene.stage"}));
+}
+
+TEST(Apply, TheProjectStaysBesideAnOutput)
+{
+    const Scene scene;
+    const std::string before = contentOf(scene.project);
+    const auto result = scene.folder / "result.stage";
+    const auto document = scene.folder / "report.json";
+    EXPECT_TRUE(tells(scene.apply({"--json", document}).out,
+                      "Written     " + document.string() + ", no project; give -o PROJECT.stage or --in-place\n"));
+
+    const Outcome outcome = scene.apply({"-o", result, "--json", document, "--summary"});
+
+    EXPECT_EQ(contentOf(scene.project), before);
+    EXPECT_EQ(json::parse(contentOf(document)).at("written"), result.string());
+    EXPECT_TRUE(tells(outcome.out, "Written     " + result.string() + ", " + document.string() + "\n")) << outcome.out;
+}
+
+TEST(Apply, InPlaceTheProjectIsReplaced)
+{
+    const Scene scene;
+    const auto result = scene.folder / "result.stage";
+    ASSERT_EQ(scene.apply({"-o", result}).status, 0);
+
+    EXPECT_EQ(scene.apply({"--in-place"}).status, 0);
+
+    EXPECT_EQ(contentOf(scene.project), contentOf(result));
+}
+
+TEST(Apply, ChangeEdlsThatWereMadeBeforeDoTheSame)
+{
+    const Scene scene;
+    const auto change = scene.folder / "change.edl";
+    ASSERT_EQ(
+        runCadrel({"generate", "--old", scene.oldFile, "--new", scene.newFile, "-o", change, "--json", "/dev/null"})
+            .status,
+        0);
+    const auto result = scene.folder / "result.stage";
+    ASSERT_EQ(scene.apply({"-o", result}).status, 0);
+    const auto other = scene.folder / "other.stage";
+
+    const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "-o", other});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_TRUE(tells(outcome.out, "Change EDL  change.edl: 3 events, all valid\n")) << outcome.out;
+    for (const char* const track : {"DIA", "FX", "Guide", "Memos", "Destination"})
+        EXPECT_EQ(placesOn(track, other), placesOn(track, result)) << track;
+    // Without the new cut nobody knows of new picture.
+    EXPECT_EQ(placesOn("Insert", other), Places());
+}
+
+TEST(Apply, EventsAreToldThatArePassedOver)
+{
+    const Scene scene;
+    const std::string change = scene.folder.write(
+        "change.edl", "TITLE: CHANGE\n" + cut("001", "A001", "01:00:00:00 01:00:10:00", "01:00:00:00 01:00:10:00") +
+                          cut("002", "A002", "01:00:12:00 01:00:20:30", "01:00:10:00 01:00:18:00") +
+                          cut("003", "A003", "01:00:20:00 01:00:20:00", "01:00:22:00 01:00:32:00"));
+
+    const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "--summary"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_TRUE(tells(outcome.out, "Applied     1 event in")) << outcome.out;
+    EXPECT_TRUE(tells(outcome.out,
+                      "Passed over 2 events\n"
+                      "            002  01:00:10:00  01:00:18:00  A002: has a timecode that doesn't exist at 24 fps\n"
+                      "            003  01:00:22:00  01:00:32:00  A003: nothing of the old programme goes there\n"))
+        << outcome.out;
+    // What the file warns of is told as it is of every EDL.
+    EXPECT_TRUE(tells(outcome.err, "check the file and the frame rate of the project\n")) << outcome.err;
+}
+
+TEST(Apply, WhereStretchesOverlapTheLastOneHolds)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+        const std::string change = scene.folder.write(
+            "change.edl", "TITLE: CHANGE\n" + cut("001", "A001", "01:00:00:00 01:00:12:00", "01:00:00:00 01:00:12:00") +
+                              cut("002", "A001", "01:00:00:00 01:00:05:00", "01:00:09:00 01:00:14:00"));
+
+        const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "--json", "-"});
+
+        EXPECT_EQ(changesOf(json::parse(outcome.out), "DIA"),
+                  (Words{"hello: 1-4 -> 1-4, 10-13", "long line: 8-14 -> 8-9", "lost line: 10.5-11.5 -> nothing",
+                         "answer: 13-16 -> nothing", "over the cut: 18-21 -> nothing", "goodbye: 24-26 -> nothing"}));
+        const json changes = named(json::parse(outcome.out).at("tracks"), "DIA").at("changes");
+        EXPECT_TRUE(named(changes, "hello").at("doubled"));
+        EXPECT_FALSE(named(changes, "hello").at("split"));
+        EXPECT_EQ(named(changes, "long line").at("trimmed").at("end").at("timecode"), "00:00:05:00");
+    }
+}
+
+TEST(Apply, ARunThatWouldOnlyEmptyTheTracksIsRefused)
+{
+    const Scene scene;
+    const std::string before = contentOf(scene.project);
+    const std::string change = scene.folder.write(
+        "change.edl", "TITLE: CHANGE\n" + cut("001", "A001", "01:00:00:00 01:00:00:00", "01:00:00:00 01:00:10:00"));
+
+    const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "--in-place"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.err, "cadrel: " + change +
+                               ": no change event can be applied (the first: nothing of the old programme goes there); "
+                               "check the timecodes and the frame rate of the project\n");
+    EXPECT_EQ(contentOf(scene.project), before);
+}
+
+TEST(Apply, OnlySelectedTracksChangeWhereTheyAreAskedFor)
+{
+    const Scene scene;
+
+    const json report = scene.applyAsJson({"--tracks", "selected"});
+
+    EXPECT_EQ(changesOf(report, "DIA").size(), 5U);
+    EXPECT_EQ(changesOf(report, "FX"), Words());
+}
+
+TEST(Apply, WithoutASelectedTrackThereIsNothingToDo)
+{
+    const Scene scene;
+    std::string text = contentOf(scene.project);
+    text.replace(text.find("\"selected\": true"), 16, "\"selected\": false");
+    writeFile(scene.project, text);
+
+    const Outcome outcome = scene.apply({"--tracks", "selected", "--in-place"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.err,
+              "cadrel: " + scene.project + ": no track is selected; select the tracks in it, or give --tracks all\n");
+    EXPECT_EQ(contentOf(scene.project), text);
+}
+
+/// How many markers of each kind a report has.
+std::map<std::string, std::size_t> kindsIn(const json& report)
+{
+    std::map<std::string, std::size_t> kinds;
+    for (const json& marker : report.at("markers"))
+        ++kinds[marker.at("kind")];
+    return kinds;
+}
+
+TEST(Apply, EachKindOfMarkerCanBeSwitchedOff)
+{
+    // Two stretches that want 9 to 10 of DIA, where the long line lies in both.
+    const Scene scene;
+    const std::string change = scene.folder.write(
+        "change.edl", "TITLE: CHANGE\n" + cut("001", "A001", "01:00:00:00 01:00:10:00", "01:00:00:00 01:00:10:00") +
+                          cut("002", "A002", "01:00:08:00 01:00:14:00", "01:00:09:00 01:00:15:00"));
+    const auto overlapsWith = [&](const std::string& option) {
+        const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, option, "--json", "-"});
+        return kindsIn(json::parse(outcome.out))["Overlap"];
+    };
+    EXPECT_EQ(overlapsWith("--overlap-markers"), 1U);
+    EXPECT_EQ(overlapsWith("--no-overlap-markers"), 0U);
+
+    const std::string folder = CADREL_EXAMPLES "/reel3/";
+    const auto kindsWith = [&](const std::string& option) {
+        const Outcome outcome =
+            runCadrel({"apply", folder + "reel3.stage", "--old", folder + "reel3_v07.edl", "--new",
+                       folder + "reel3_v12.edl", "--vfx", "VFX_****_v,_comp", option, "--json", "-"});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return kindsIn(json::parse(outcome.out));
+    };
+    auto expected = kindsWith("--destination-markers");
+    ASSERT_EQ(expected.size(), 5U);
+    for (const auto& [option, kind] :
+         std::map<std::string, std::string>{{"--no-destination-markers", "Destination"},
+                                            {"--no-insert-markers", "Insert"},
+                                            {"--no-dissolve-wipe-markers", "Dissolve/Wipe"},
+                                            {"--no-automation-markers", "Automation Warning"},
+                                            {"--no-snippet-markers", "Audio Snippet"}}) {
+        auto without = expected;
+        without.erase(kind);
+        EXPECT_EQ(kindsWith(option), without) << option;
+    }
+}
+
+TEST(Apply, TheLastOfTwoOppositeOptionsHolds)
+{
+    const Scene scene;
+
+    EXPECT_EQ(kindsIn(scene.applyAsJson({"--no-insert-markers", "--insert-markers"}))["Insert"], 1U);
+    EXPECT_EQ(kindsIn(scene.applyAsJson({"--insert-markers", "--no-insert-markers"}))["Insert"], 0U);
+}
+
+TEST(Apply, OverhangsGoAlongUpToTheirThreshold)
+{
+    const Scene scene;
+    const std::string whole = "over the cut: 18-21 -> 16-19";
+    const std::string inTwo = "over the cut: 18-21 -> 16-18, 22-23";
+    // A second, 24 frames and a third of the clip, hangs over the end of TWO.
+    const auto becomes = [&](const Words& options) { return changesOf(scene.applyAsJson(options), "DIA").at(3); };
+
+    EXPECT_EQ(becomes({}), inTwo);
+    EXPECT_EQ(becomes({"--overhang", "23"}), inTwo);
+    EXPECT_EQ(becomes({"--overhang", "24"}), whole);
+    EXPECT_EQ(becomes({"--overhang", "24", "--overhang-percent", "33"}), inTwo);
+    EXPECT_EQ(becomes({"--overhang", "24", "--overhang-percent", "34"}), whole);
+    EXPECT_EQ(becomes({"--overhang", "24", "--no-overhang-percent"}), whole);
+    EXPECT_EQ(becomes({"--no-overhang"}), inTwo);
+}
+
+TEST(Apply, SliversAreMarkedUpToTheirThreshold)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+
+        EXPECT_EQ(markersOf(scene.applyAsJson({"--remains", "24"}), "Audio Snippet"),
+                  (Words{"22-23 Audio snippet in DIA"}));
+        EXPECT_EQ(markersOf(scene.applyAsJson({"--remains", "23"}), "Audio Snippet"), Words());
+    }
+}
+
+TEST(Apply, VirginTerritoriesLeadTheAutomationOverWhatHasNoOldSound)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+        const auto result = scene.folder / "result.stage";
+        const auto volumeWith = [&](const std::string& option) {
+            EXPECT_EQ(scene.apply({"-o", result, option}).status, 0);
+            const json shown = show(result);
+            Words points;
+            for (const json& point : named(shown.at("tracks"), "DIA").at("automation").at(0).at("points"))
+                points.push_back(brief(secondsOf(point)) + ": " + brief(point.at("value").get<double>()));
+            // What comes in before the film is none of this.
+            points.erase(points.begin(), std::find(points.begin(), points.end(), "11: 0.25"));
+            return points;
+        };
+
+        // Where TWO ends, and where THREE begins, the volume is what it has been since 16.
+        EXPECT_EQ(volumeWith("--virgin-territories"), (Words{"11: 0.25", "14: 0.75", "18: 0.75", "22: 0.75"}));
+        EXPECT_EQ(volumeWith("--no-virgin-territories"), (Words{"11: 0.25", "14: 0.75"}));
+    }
+}
+
+TEST(Apply, OutsideOfAPreservedStretchNothingChanges)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+        const auto result = scene.folder / "result.stage";
+
+        const Outcome outcome =
+            scene.apply({"--preserve", "01:00:10:00", "01:00:20:00", "-o", result, "--json", "/dev/null"});
+
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        EXPECT_TRUE(tells(outcome.out, "Settings    between 01:00:10:00 and 01:00:20:00 alone\n")) << outcome.out;
+        EXPECT_TRUE(
+            tells(outcome.out, "003  01:00:22:00  01:00:32:00  A003: lies outside of the stretch that may change\n"))
+            << outcome.out;
+        EXPECT_EQ(placesOn("DIA", result), (Places{{"hello", {"1-4"}},
+                                                   {"long line", {"8-10", "10-12 from 4"}},
+                                                   {"answer", {"11-14"}},
+                                                   {"over the cut", {"16-18", "20-21 from 2"}},
+                                                   {"goodbye", {"24-26"}}}));
+    }
+}
+
+TEST(Apply, APreservedStretchHasToBeOne)
+{
+    const Scene scene;
+    const auto refusal = [&](const std::string& before, const std::string& after) {
+        const Outcome outcome = scene.apply({"--preserve", before, after});
+        EXPECT_EQ(outcome.status, 2);
+        return outcome.err;
+    };
+
+    EXPECT_TRUE(tells(refusal("01:00:20:00", "01:00:10:00"), "the second timecode has to lie behind the first"));
+    EXPECT_TRUE(tells(refusal("01:00:10:24", "01:00:20:00"), "\"01:00:10:24\" is no timecode of the project"));
+    EXPECT_TRUE(tells(refusal("10", "20"), "\"10\" is no timecode of the project"));
+    EXPECT_EQ(scene.apply({"--preserve", "-00:00:10:00", "01:00:20:00"}).status, 0);
+}
+
+TEST(Apply, WhatIsNotGivenIsAsInTheLastRun)
+{
+    const Scene scene;
+    const auto result = scene.folder / "result.stage";
+    ASSERT_EQ(scene
+                  .apply({"-o", result, "--no-destination-markers", "--preserve", "01:00:00:00", "01:00:30:00",
+                          "--overhang", "3", "--remains", "7", "--virgin-territories", "--tracks", "selected",
+                          "--match", "clip", "--no-b-roll"})
+                  .status,
+              0);
+    const auto settingsWith = [&](const Words& more) {
+        Words words{"apply", result, "--old", scene.oldFile, "--new", scene.newFile, "--summary"};
+        words.insert(words.end(), more.begin(), more.end());
+        const Outcome outcome = runCadrel(words);
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        const std::size_t start = outcome.out.find("Settings    ");
+        return start == std::string::npos ? std::string()
+                                          : outcome.out.substr(start + 12, outcome.out.find('\n', start) - start - 12);
+    };
+
+    EXPECT_EQ(
+        settingsWith({}),
+        "selected tracks alone, matched by clip name, overhangs up to 3 frames go along, snippets up to 7 frames, "
+        "virgin territories, between 01:00:00:00 and 01:00:30:00 alone, no destination markers, no B-rolls");
+    EXPECT_EQ(settingsWith({"--destination-markers", "--no-preserve", "--no-overhang", "--remains", "5",
+                            "--no-virgin-territories", "--tracks", "all", "--match", "roll", "--b-roll"}),
+              "");
+}
+
+TEST(Apply, ASecondRunTellsItsOwnMarkersAlone)
+{
+    const Scene scene;
+    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+
+    const json report = scene.applyAsJson();
+
+    EXPECT_EQ(markersOf(report, "Destination"),
+              (Words{"0-10 Event: 1 - A001 ", "10-18 Event: 2 - A002 ", "22-32 Event: 3 - A003 "}));
+    EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
+}
+
+TEST(Apply, ABrokenModelIsToldOfAndReplaced)
+{
+    const Scene scene;
+    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+    std::string text = contentOf(scene.project);
+    const std::size_t checksum = text.find("\"CaDs\": ") + 8;
+    text.replace(checksum, text.find_first_of(",\n", checksum) - checksum, std::string("1"));
+    writeFile(scene.project, text);
+
+    const Outcome outcome = scene.apply({"--in-place"});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_TRUE(tells(outcome.err, "An error occurred while loading the Cadrel data. The data will be ignored."))
+        << outcome.err;
+    EXPECT_EQ(scene.apply().err, "");
+}
+
+TEST(Apply, TheProjectHasToRunAtTheRateThatIsGiven)
+{
+    const Scene scene;
+
+    EXPECT_EQ(scene.apply({"--rate", "24 fps"}).status, 0);
+    const Outcome outcome = scene.apply({"--rate", "25 fps"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.err,
+              "cadrel: " + scene.project +
+                  ": runs at 24 fps and not at 25 fps; give the EDLs of this project, or correct its rate\n");
+}
+
+TEST(Apply, AnInputIsNeverOverwritten)
+{
+    const Scene scene;
+    const std::string before = contentOf(scene.project);
+    const auto refuse = [&](const Words& options, const std::string& advice) {
+        const Outcome outcome = scene.apply(options);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.out, "");
+        EXPECT_TRUE(tells(outcome.err, advice)) << outcome.err;
+    };
+
+    refuse({"-o", scene.project}, "is the project itself; give --in-place to replace it");
+    refuse({"-o", scene.oldFile}, "would overwrite another file of this run");
+    refuse({"--json", scene.project}, "would overwrite another file of this run");
+    refuse({"--json", scene.newFile}, "would overwrite another file of this run");
+    refuse({"-o", scene.folder / "x", "--json", scene.folder / "x"}, "would overwrite another file of this run");
+    refuse({"-o", scene.folder / "x", "--in-place"}, "--in-place");
+    refuse({"-o", "-"}, "is no file name");
+    refuse({"-o", ""}, "the name is empty");
+    EXPECT_EQ(contentOf(scene.project), before);
+    EXPECT_EQ(contentOf(scene.oldFile), oldCut());
+    EXPECT_EQ(contentOf(scene.newFile), newCut());
+    EXPECT_EQ(scene.folder.names(), (Words{"new.edl", "old.edl", "scene.stage"}));
+}
+
+TEST(Apply, BothCutsOrAChangeEdlAreNeeded)
+{
+    const Scene scene;
+    const auto refuse = [](const Words& arguments, const std::string& what) {
+        const Outcome outcome = runCadrel(arguments);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_TRUE(tells(outcome.err, what)) << outcome.err;
+    };
+
+    refuse({"apply", scene.project}, "give the two cuts with --old and --new, or a change EDL with --change");
+    refuse({"apply", scene.project, "--old", scene.oldFile}, "--new");
+    refuse({"apply", scene.project, "--new", scene.newFile}, "--old");
+    refuse(scene.arguments({"--change", scene.oldFile}), "--change");
+    refuse({"apply", scene.project, "--change", scene.oldFile, "--heal", "gaps"}, "--heal");
+    refuse({"apply", "--old", scene.oldFile, "--new", scene.newFile}, "PROJECT");
+    refuse(scene.arguments({"--vfx", "no comma"}), "has no comma");
+}
+
+TEST(Apply, AFailureLeavesTheFilesAsTheyWere)
+{
+    const Scene scene;
+    const std::string before = contentOf(scene.project);
+    const std::string document = scene.folder.write("report.json", "former report");
+    const auto fail = [&](const Words& options, const std::string& line) {
+        const Outcome outcome = scene.apply(options);
+        EXPECT_EQ(outcome.status, 1);
+        EXPECT_EQ(outcome.out, "");
+        EXPECT_EQ(outcome.err, "cadrel: " + line + "\n");
+    };
+    const std::string lost = scene.folder / "none/result.stage";
+
+    fail({"-o", lost, "--json", document}, lost + ": the folder does not exist; make it or give another");
+    fail({"-o", "/dev/full", "--json", document}, "/dev/full: can't be written; see whether the disk is full");
+    fail({"--in-place", "--json", "/dev/full"}, "/dev/full: can't be written; see whether the disk is full");
+    writeFile(scene.newFile, "");
+    fail({"--in-place", "--json", document}, scene.newFile + ": holds no events; give a CMX EDL");
+
+    EXPECT_EQ(contentOf(scene.project), before);
+    EXPECT_EQ(contentOf(document), "former report");
+    EXPECT_EQ(scene.folder.names(), (Words{"new.edl", "old.edl", "report.json", "scene.stage"}));
+}
+
+TEST(Apply, AProjectThatCantBeReadIsRefused)
+{
+    Scene scene;
+    const auto refusal = [&](const std::string& project) {
+        scene.project = project;
+        const Outcome outcome = scene.apply();
+        EXPECT_EQ(outcome.status, 1);
+        return outcome.err;
+    };
+
+    const std::string none = scene.folder / "none.stage";
+    EXPECT_EQ(refusal(none), "cadrel: " + none + ": no such file; check the name and the folder\n");
+    EXPECT_EQ(refusal(scene.folder.path()),
+              "cadrel: " + scene.folder.path().string() + ": is a folder; give the project file in it\n");
+    EXPECT_TRUE(tells(refusal(scene.oldFile), "take an intact copy, or the version of Cadrel that wrote it\n"));
+    const std::string empty = scene.folder.write("empty.stage", projectAt(24, false, false, 3600));
+    EXPECT_EQ(refusal(empty),
+              "cadrel: " + empty + ": has no tracks that a run could change; give a project with sound\n");
+}
+
+/// A film of a hundred shots of a second, each six frames shorter in the new cut, and forty tracks of sound under it, so that
+/// a run takes a while.
+class LongScene {
+public:
+    LongScene()
+    {
+        std::string oldText;
+        std::string newText;
+        for (int shot = 0; shot < ShotCount; ++shot) {
+            const std::string roll = std::string("R").append(std::to_string(100 + shot));
+            oldText += cut("001", roll, "10:00:00:12 10:00:01:12", at(24 * shot) + " " + at(24 * (shot + 1)));
+            newText += cut("001", roll, "10:00:00:12 10:00:01:06", at(18 * shot) + " " + at(18 * (shot + 1)));
+        }
+        std::string tracks;
+        for (int track = 0; track < 40; ++track) {
+            std::string events;
+            for (int clip = 0; clip < 2 * ShotCount; ++clip)
+                events += std::string(clip == 0 ? "" : ",") + R"({"kind": "clip", "start": )" +
+                          std::to_string(clip * 0.5) + R"(, "end": )" + std::to_string(clip * 0.5 + 0.4) + "}";
+            tracks +=
+                std::string(track == 0 ? "" : ",") + R"({"kind": "audio", "name": "A", "events": [)" + events + "]}";
+        }
+        project = folder.write("long.stage", projectWith(tracks));
+        oldFile = folder.write("old.edl", oldText);
+        newFile = folder.write("new.edl", newText);
+    }
+
+    Words arguments(const Words& more) const
+    {
+        Words words{"apply", project, "--old", oldFile, "--new", newFile};
+        words.insert(words.end(), more.begin(), more.end());
+        return words;
+    }
+
+    const TempFolder folder;
+    std::string project;
+    std::string oldFile;
+    std::string newFile;
+
+private:
+    static constexpr int ShotCount = 100;
+
+    static std::string at(int frame)
+    {
+        std::array<char, 16> text{};
+        std::snprintf(text.data(), text.size(), "00:%02d:%02d:%02d", frame / 24 / 60, frame / 24 % 60, frame % 24);
+        return text.data();
+    }
+};
+
+TEST(Apply, OnATerminalTheProgressOfTheRunIsShown)
+{
+    const Scene scene;
+
+    const Outcome outcome = runCadrelOnTerminal(scene.arguments({"--summary"}));
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_TRUE(tells(outcome.out, "Processing Project")) << outcome.out;
+    EXPECT_TRUE(tells(outcome.out, "Applied     3 events")) << outcome.out;
+    EXPECT_EQ(scene.apply({"--summary"}).err, "");
+}
+
+TEST(Apply, AnInterruptionTakesTheRunBackAndLeavesTheFilesAsTheyWere)
+{
+    const LongScene scene;
+    const std::string before = contentOf(scene.project);
+    const std::string document = scene.folder.write("report.json", "former report");
+
+    const Outcome outcome =
+        runCadrelInterruptedAt("Processing Project", scene.arguments({"--in-place", "--json", document}));
+
+    EXPECT_EQ(outcome.status, -1);
+    EXPECT_FALSE(tells(outcome.out, "Applied")) << outcome.out;
+    EXPECT_EQ(contentOf(scene.project), before);
+    EXPECT_EQ(contentOf(document), "former report");
+    EXPECT_EQ(scene.folder.names(), (Words{"long.stage", "new.edl", "old.edl", "report.json"}));
+}
+
+TEST(Apply, TheSoundOfAReelGoesOverToItsNewCut)
+{
+    const std::string folder = CADREL_EXAMPLES "/reel3/";
+
+    const Outcome outcome = runCadrel({"apply", folder + "reel3.stage", "--old", folder + "reel3_v07.edl", "--new",
+                                       folder + "reel3_v12.edl", "--vfx", "VFX_****_v,_comp", "--json", "-"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    const json tracks = json::parse(outcome.out).at("tracks");
+    const auto fateOf = [&](const char* track, const char* clip) {
+        const json& change = named(named(tracks, track).at("changes"), clip);
+        std::string text = change.at("was").at("in").at("timecode");
+        for (const json& piece : change.at("now"))
+            text += " > " + piece.at("in").at("timecode").get<std::string>();
+        return text;
+    };
+    // Scene 43 is out, and 44 has taken its place.
+    EXPECT_EQ(fateOf("Scenes", "43 Stair"), "03:03:50:21");
+    EXPECT_EQ(fateOf("Props", "hand on handle"), "03:04:04:14");
+    // The wide shot of the weir, in the opening, is used a second time.
+    EXPECT_TRUE(named(named(tracks, "Scenes").at("changes"), "41 Weir, dawn").at("doubled"));
+    // Maren's line in scene 46 has gone before scene 45 with it: old 03:09:22:19, new 03:05:56:20.
+    EXPECT_EQ(fateOf("DIA 1", "46A-2 Maren, low"), "03:09:35:05 > 03:06:09:06");
+    // The picture and its sound are locked.
+    EXPECT_EQ(named(tracks, "Old Video").at("stay"), 1);
+    EXPECT_EQ(named(tracks, "Guide").at("stay"), 1);
+}
+
+} // namespace
