@@ -2,7 +2,7 @@
 
 #include "app/Failure.h"
 #include "app/JsonOutput.h"
-#include "app/ProjectFramerate.h"
+#include "app/edl/ProjectFramerate.h"
 #include "core/Settings.h"
 
 #include <CLI/CLI.hpp>

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "app/ApplyCommand.h"
-#include "app/GenerateCommand.h"
-#include "app/ListCommand.h"
-#include "app/ShowCommand.h"
+#include "app/apply/ApplyCommand.h"
+#include "app/edl/GenerateCommand.h"
+#include "app/edl/ListCommand.h"
+#include "app/project/ShowCommand.h"
 
 #include <optional>
 

@@ -1,0 +1,77 @@
+#include "app/apply/ApplyFacts.h"
+
+#include "core/DataModel.h"
+#include "host/TrackRole.h"
+#include "velmark/Attributes.h"
+
+#include <algorithm>
+#include <variant>
+
+namespace cadrel::app {
+
+using host::TrackRole;
+using standin::Track;
+
+namespace {
+
+/// Whether runs mark on the track, which is so for all marker tracks of the system but that of the user's memos.
+bool isMarkedByRuns(const Track& track)
+{
+    const auto attribute = track.attributes().find(Velmark::AttributeKey::MarkerType);
+    if (attribute == track.attributes().end())
+        return false;
+    const auto* role = std::get_if<Velmark::int64>(&attribute->second.value);
+    return role && *role >= TrackRole::Destination && *role <= TrackRole::Overlap;
+}
+
+} // namespace
+
+std::vector<const TrackComparison*> ApplyFacts::userTracks() const
+{
+    std::vector<const TrackComparison*> found;
+    for (const TrackComparison& track : tracks) {
+        if (!isMarkedByRuns(*track.track) && !(track.fates.empty() && track.added.empty()))
+            found.push_back(&track);
+    }
+    return found;
+}
+
+std::vector<const TrackComparison*> ApplyFacts::markedTracks() const
+{
+    std::vector<const TrackComparison*> found;
+    for (const TrackComparison& track : tracks) {
+        if (isMarkedByRuns(*track.track) && !track.added.empty())
+            found.push_back(&track);
+    }
+    return found;
+}
+
+std::size_t ApplyFacts::appliedCount() const
+{
+    return model.changeEdl().size() - passedOver.size();
+}
+
+FateCount& FateCount::operator+=(const TrackComparison& track)
+{
+    const auto count = [&track](auto test) {
+        return static_cast<std::size_t>(std::count_if(track.fates.begin(), track.fates.end(), test));
+    };
+    all += track.fates.size();
+    stay += count([](const Fate& fate) { return fate.stays(); });
+    moved += count([](const Fate& fate) { return fate.isMoved; });
+    trimmed += count([](const Fate& fate) { return fate.isTrimmed(); });
+    split += count([](const Fate& fate) { return fate.isSplit; });
+    doubled += count([](const Fate& fate) { return fate.isDoubled; });
+    lost += count([](const Fate& fate) { return fate.isLost(); });
+    added += track.added.size();
+    return *this;
+}
+
+FateCount countOf(const TrackComparison& track)
+{
+    FateCount count;
+    count += track;
+    return count;
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,62 @@
+#pragma once
+
+#include "app/apply/ProjectComparison.h"
+#include "app/edl/GenerationReport.h"
+
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace cadrel::core {
+class DataModel;
+class EventBase;
+} // namespace cadrel::core
+
+namespace cadrel::app {
+
+/// A change event that a run leaves out, and why.
+struct PassedOver {
+    const core::EventBase* event;
+    std::string reason;
+};
+
+/// What there is to tell about a run.
+struct ApplyFacts {
+    /// The model outlives the facts.
+    explicit ApplyFacts(const core::DataModel& ofProject) : model(ofProject) {}
+
+    /// The tracks of the user on which something lies or lay, and those on which runs mark.
+    std::vector<const TrackComparison*> userTracks() const;
+    std::vector<const TrackComparison*> markedTracks() const;
+    std::size_t appliedCount() const;
+
+    const core::DataModel& model;
+    std::string projectName;
+    double timeOrigin = 0.0;                    ///< of the project
+    std::optional<GenerationReport> generation; ///< nothing where the change EDL was given
+    std::vector<std::string> changeNames;       ///< its files then
+    std::vector<PassedOver> passedOver;
+    std::vector<TrackComparison> tracks;
+    double seconds = 0.0; ///< that the run took
+    std::string written;  ///< the project file; empty for none
+    std::string jsonFile; ///< the file of the report; empty for none
+};
+
+/// How many clips and markers became what. One that was moved and trimmed counts in both.
+struct FateCount {
+    std::size_t all = 0;
+    std::size_t stay = 0;
+    std::size_t moved = 0;
+    std::size_t trimmed = 0;
+    std::size_t split = 0;
+    std::size_t doubled = 0;
+    std::size_t lost = 0;
+    std::size_t added = 0;
+
+    FateCount& operator+=(const TrackComparison& track);
+};
+
+FateCount countOf(const TrackComparison& track);
+
+} // namespace cadrel::app

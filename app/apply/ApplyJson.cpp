@@ -1,0 +1,129 @@
+#include "app/apply/ApplyJson.h"
+
+#include "core/DataModel.h"
+#include "core/EventBase.h"
+#include "standin/file/Utf16.h"
+
+#include <utility>
+
+namespace cadrel::app {
+
+using nlohmann::ordered_json;
+using standin::toUtf8;
+using standin::Track;
+
+namespace {
+
+ordered_json describe(const Placement& placement)
+{
+    ordered_json facts{{"kind", placement.isMarker() ? "marker" : "clip"}, {"name", toUtf8(placement.name)}};
+    if (placement.clip)
+        facts["clip"] = toUtf8(placement.clip->name());
+    if (!placement.part.empty())
+        facts["part"] = toUtf8(placement.part);
+    return facts;
+}
+
+} // namespace
+
+ordered_json ApplyJson::toJson() const
+{
+    const core::EventList& changes = facts_.model.changeEdl();
+    ordered_json passedOver = ordered_json::array();
+    for (const PassedOver& passed : facts_.passedOver)
+        passedOver.push_back({{"number", passed.event->eventNumber()},
+                              {"dstIn", passed.event->dstIn().toString()},
+                              {"dstOut", passed.event->dstOut().toString()},
+                              {"roll", passed.event->rollName()},
+                              {"reason", passed.reason}});
+    ordered_json tracks = ordered_json::array();
+    for (const TrackComparison* const track : facts_.userTracks())
+        tracks.push_back(toJson(*track));
+    ordered_json markers = ordered_json::array();
+    for (const TrackComparison* const track : facts_.markedTracks()) {
+        for (const Placement& marker : track->added) {
+            ordered_json facts{{"kind", toUtf8(track->track->name())}, {"name", toUtf8(marker.name)}};
+            facts.update(span(marker.start, marker.end));
+            markers.push_back(std::move(facts));
+        }
+    }
+
+    ordered_json json{{"project", facts_.projectName}, {"rate", clock_.rateLabel()}};
+    if (facts_.generation)
+        json.update(facts_.generation->toJson());
+    else
+        json["change"] = {{"files", facts_.changeNames}, {"invalid", changes.countInvalid()}};
+    json["applied"] = facts_.appliedCount();
+    json["passedOver"] = std::move(passedOver);
+    json["seconds"] = facts_.seconds;
+    json["tracks"] = std::move(tracks);
+    json["markers"] = std::move(markers);
+    json["written"] = facts_.written.empty() ? ordered_json() : ordered_json(facts_.written);
+    return json;
+}
+
+ordered_json ApplyJson::toJson(const Fate& fate) const
+{
+    ordered_json pieces = ordered_json::array();
+    for (const Piece& piece : fate.pieces) {
+        ordered_json now = span(piece.now.start, piece.now.end);
+        now["shift"] = length(piece.shift);
+        pieces.push_back(std::move(now));
+    }
+    ordered_json facts = describe(fate.before);
+    facts["moved"] = fate.isMoved;
+    facts["trimmed"] = {
+        {"start", length(fate.lostAtStart)}, {"middle", length(fate.lostBetween)}, {"end", length(fate.lostAtEnd)}};
+    facts["split"] = fate.isSplit;
+    facts["doubled"] = fate.isDoubled;
+    facts["was"] = span(fate.before.start, fate.before.end);
+    facts["now"] = std::move(pieces);
+    return facts;
+}
+
+ordered_json ApplyJson::toJson(const TrackComparison& track) const
+{
+    const FateCount count = countOf(track);
+    ordered_json changes = ordered_json::array();
+    for (const Fate& fate : track.fates) {
+        if (!fate.stays())
+            changes.push_back(toJson(fate));
+    }
+    for (const Placement& placement : track.added) {
+        ordered_json facts = describe(placement);
+        facts["was"] = nullptr;
+        facts["now"] = ordered_json::array({span(placement.start, placement.end)});
+        changes.push_back(std::move(facts));
+    }
+    ordered_json folders = ordered_json::array();
+    for (const Track* const folder : foldersAround(*track.track))
+        folders.push_back(toUtf8(folder->name()));
+    return {{"name", toUtf8(track.track->name())},
+            {"kind", Track::wordOf(track.track->kind())},
+            {"folders", std::move(folders)},
+            {"locked", track.track->isLocked()},
+            {"holds", count.all},
+            {"stay", count.stay},
+            {"moved", count.moved},
+            {"trimmed", count.trimmed},
+            {"split", count.split},
+            {"doubled", count.doubled},
+            {"inNoCut", count.lost},
+            {"new", count.added},
+            {"changes", std::move(changes)}};
+}
+
+ordered_json ApplyJson::span(double start, double end) const
+{
+    const auto time = [this](double seconds) {
+        return ordered_json{{"seconds", seconds}, {"timecode", clock_.timecode(seconds)}};
+    };
+    return {{"in", time(start)}, {"out", time(end)}};
+}
+
+ordered_json ApplyJson::length(double seconds) const
+{
+    return {{"seconds", seconds}, {"timecode", clock_.length(seconds)}};
+}
+
+} // namespace cadrel::app

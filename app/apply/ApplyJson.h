@@ -1,0 +1,30 @@
+#pragma once
+
+#include "app/apply/ApplyFacts.h"
+#include "app/project/ProjectClock.h"
+
+#include <nlohmann/json.hpp>
+
+namespace cadrel::app {
+
+/// What a run did to a project as JSON for other programs: all but the change events. A time is an object of "seconds", from
+/// the time origin, and the "timecode" that the project's clock shows then; a length is one of "seconds" and their
+/// "timecode".
+class ApplyJson {
+public:
+    /// Both outlive this.
+    ApplyJson(const ApplyFacts& facts, const ProjectClock& clock) : facts_(facts), clock_(clock) {}
+
+    nlohmann::ordered_json toJson() const;
+
+private:
+    nlohmann::ordered_json toJson(const TrackComparison& track) const;
+    nlohmann::ordered_json toJson(const Fate& fate) const;
+    nlohmann::ordered_json span(double start, double end) const;
+    nlohmann::ordered_json length(double seconds) const;
+
+    const ApplyFacts& facts_;
+    const ProjectClock& clock_;
+};
+
+} // namespace cadrel::app

@@ -1,0 +1,296 @@
+#include "app/apply/ApplyListing.h"
+
+#include "app/Columns.h"
+#include "app/Printable.h"
+#include "app/Wording.h"
+#include "core/DataModel.h"
+#include "core/EventBase.h"
+#include "core/Settings.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <cstdio>
+#include <ostream>
+#include <string>
+#include <vector>
+
+namespace cadrel::app {
+
+using core::Settings;
+using standin::Track;
+
+namespace {
+
+/// "300: 20 stay, 250 moved, 30 trimmed".
+std::string inWords(const FateCount& count)
+{
+    std::vector<std::string> parts;
+    const auto add = [&parts](std::size_t number, const char* what) {
+        if (number > 0)
+            parts.push_back(std::to_string(number) + " " + what);
+    };
+    add(count.stay, "stay");
+    add(count.moved, "moved");
+    add(count.trimmed, "trimmed");
+    add(count.split, "split");
+    add(count.doubled, "doubled");
+    add(count.lost, "in no cut");
+    add(count.added, "new");
+    return std::to_string(count.all) + (parts.empty() ? "" : ": ") + joined(parts);
+}
+
+std::string secondsText(double seconds)
+{
+    std::array<char, 32> text{};
+    std::snprintf(text.data(), text.size(), "%.1f s", seconds);
+    return text.data();
+}
+
+/// What the settings say that isn't usual.
+std::vector<std::string> unusualSettings(const Settings& settings, const ProjectClock& clock, double origin)
+{
+    std::vector<std::string> words;
+    const auto add = [&words](bool isUnusual, const std::string& what) {
+        if (isUnusual)
+            words.push_back(what);
+    };
+    const auto frames = [](std::int32_t count) {
+        return counted(static_cast<std::size_t>(std::max(count, 0)), "frame");
+    };
+    const Settings usual;
+    add(settings.applyTo() != usual.applyTo(), "selected tracks alone");
+    add(settings.matchBy() != usual.matchBy(), "matched by clip name");
+    add(settings.includeOverhangingAudioEvents(),
+        "overhangs up to " + frames(settings.snippetThreshold()) + " go along");
+    add(settings.remainsThreshold() != usual.remainsThreshold(),
+        "snippets up to " + frames(settings.remainsThreshold()));
+    add(settings.createVirginTerritories(), "virgin territories");
+    add(settings.restrictRange(), "between " + clock.exactTimecode(settings.preserveMaterialBefore() - origin) +
+                                      " and " + clock.exactTimecode(settings.preserveMaterialAfter() - origin) +
+                                      " alone");
+    add(!settings.createDestinationMarkers(), "no destination markers");
+    add(!settings.createInsertMarkers(), "no insert markers");
+    add(!settings.createDissolveWipeMarkers(), "no dissolve and wipe markers");
+    add(!settings.createAutomationWarningMarkers(), "no automation markers");
+    add(!settings.createAudioSnippetMarkers(), "no snippet markers");
+    add(!settings.createOverlapMarkers(), "no overlap markers");
+    add(!settings.bRollRenaming(), "no B-rolls");
+    return words;
+}
+
+std::string nameOf(const Placement& placement)
+{
+    const std::u16string& name = placement.name.empty() && placement.clip ? placement.clip->name() : placement.name;
+    const std::string text =
+        printableName(name, placement.isMarker() ? MostCharactersOfAMarker : MostCharactersOfAName);
+    return placement.part.empty() ? text : text + " (in " + printableName(placement.part) + ")";
+}
+
+/// "moved, trimmed by 00:00:00:18 at the end".
+std::string inWords(const Fate& fate, const ProjectClock& clock)
+{
+    std::vector<std::string> words;
+    if (fate.isLost())
+        words.emplace_back("in no cut");
+    if (fate.isMoved)
+        words.emplace_back("moved");
+    std::string trimmed;
+    const auto trim = [&](double seconds, const char* where) {
+        if (seconds > 0.0)
+            trimmed += (trimmed.empty() ? "trimmed by " : " and ") + clock.exactLength(seconds) + where;
+    };
+    trim(fate.lostAtStart, " at the start");
+    trim(fate.lostBetween, " in the middle");
+    trim(fate.lostAtEnd, " at the end");
+    if (!trimmed.empty())
+        words.push_back(trimmed);
+    if (fate.isSplit)
+        words.emplace_back("split");
+    if (fate.isDoubled)
+        words.emplace_back("doubled");
+    return joined(words);
+}
+
+/// In the order of the columns of the moves.
+const Columns::Row MoveTitles{"was in", "was out", "now in", "now out", "shift", "clip or marker", "became"};
+
+/// A row for each piece, or one for what is lost.
+std::vector<Columns::Row> rowsOf(const Fate& fate, const ProjectClock& clock)
+{
+    const auto isInstant = [](const Placement& placement) { return placement.kind == Placement::Kind::Point; };
+    const auto endOf = [&](const Placement& placement) {
+        return isInstant(placement) ? std::string() : clock.exactTimecode(placement.end);
+    };
+    Columns::Row row{clock.exactTimecode(fate.before.start),
+                     endOf(fate.before),
+                     "",
+                     "",
+                     "",
+                     nameOf(fate.before),
+                     inWords(fate, clock)};
+    std::vector<Columns::Row> rows;
+    for (const Piece& piece : fate.pieces) {
+        row[2] = clock.exactTimecode(piece.now.start);
+        row[3] = endOf(piece.now);
+        row[4] = std::abs(piece.shift) > standin::SameInstant
+                     ? std::string(piece.shift > 0.0 ? "+" : "").append(clock.exactLength(piece.shift))
+                     : std::string();
+        rows.push_back(row);
+        // What is behind the first is told of the same clip.
+        row[0].clear();
+        row[1].clear();
+        row[6].clear();
+    }
+    if (rows.empty())
+        rows.push_back(row);
+    return rows;
+}
+
+Columns::Row rowOfNew(const Placement& placement, const ProjectClock& clock)
+{
+    return {"",   "", clock.exactTimecode(placement.start), clock.exactTimecode(placement.end), "", nameOf(placement),
+            "new"};
+}
+
+std::string pathOf(const Track& track)
+{
+    std::vector<std::string> facts{Track::wordOf(track.kind())};
+    for (const Track* const folder : foldersAround(track))
+        facts.push_back("in " + printableName(folder->name()));
+    if (track.isLocked())
+        facts.emplace_back("locked");
+    return printableName(track.name()) + " (" + joined(facts) + ")";
+}
+
+std::string eventText(const core::EventBase& event)
+{
+    std::array<char, 8> number{};
+    std::snprintf(number.data(), number.size(), "%03u", event.eventNumber());
+    return std::string(number.data()) + "  " + event.dstIn().toString() + "  " + event.dstOut().toString() + "  " +
+           toPrintable(event.rollName(), MostCharactersOfAName).text;
+}
+
+} // namespace
+
+void ApplyListing::printTotals(std::ostream& out) const
+{
+    const core::DataModel& model = facts_.model;
+    const std::string rate = clock_.rateInWords() + ", as the project has it";
+    out << "Project     " << toPrintable(facts_.projectName).text << '\n';
+    if (facts_.generation)
+        out << facts_.generation->cutsText(rate) << facts_.generation->changeText();
+    else
+        out << "Frame rate  " << rate << '\n'
+            << "Change EDL  " << describeEvents(model.changeEdl(), facts_.changeNames) << '\n';
+    const std::vector<std::string> settings = unusualSettings(model.settings(), clock_, facts_.timeOrigin);
+    if (!settings.empty())
+        out << "Settings    " << joined(settings) << '\n';
+    out << "Applied     " << counted(facts_.appliedCount(), "event") << " in " << secondsText(facts_.seconds) << '\n';
+    printPassedOver(out);
+
+    printClips(out);
+    printWritten(out);
+}
+
+void ApplyListing::printPassedOver(std::ostream& out) const
+{
+    if (facts_.passedOver.empty())
+        return;
+    out << "Passed over " << counted(facts_.passedOver.size(), "event") << '\n';
+    for (const PassedOver& passed : facts_.passedOver)
+        out << "            " << eventText(*passed.event) << ": " << passed.reason << '\n';
+}
+
+void ApplyListing::printClips(std::ostream& out) const
+{
+    FateCount clips;
+    FateCount markers;
+    for (const TrackComparison* const track : facts_.userTracks())
+        (track->track->kind() == Track::Kind::Marker ? markers : clips) += *track;
+    out << "Clips       " << inWords(clips) << '\n';
+    if (markers.all + markers.added > 0)
+        out << "Own markers " << inWords(markers) << '\n';
+    std::vector<std::string> marked;
+    for (const TrackComparison* const track : facts_.markedTracks())
+        marked.push_back(std::to_string(track->added.size()) + " " + printableName(track->track->name()));
+    out << "New markers " << (marked.empty() ? "none" : joined(marked)) << '\n';
+}
+
+void ApplyListing::printWritten(std::ostream& out) const
+{
+    std::vector<std::string> written;
+    for (const std::string& file : {facts_.written, facts_.jsonFile}) {
+        if (!file.empty())
+            written.push_back(toPrintable(file).text);
+    }
+    if (facts_.written.empty())
+        written.emplace_back("no project; give -o PROJECT.stage or --in-place");
+    out << "Written     " << joined(written) << '\n';
+}
+
+void ApplyListing::printTrackTotals(std::ostream& out) const
+{
+    const auto rowOf = [](const TrackComparison& track) {
+        const auto cell = [](std::size_t number) { return number == 0 ? std::string() : std::to_string(number); };
+        const FateCount count = countOf(track);
+        return Columns::Row{pathOf(*track.track), cell(count.all),     cell(count.stay),
+                            cell(count.moved),    cell(count.trimmed), cell(count.split),
+                            cell(count.doubled),  cell(count.lost),    cell(count.added)};
+    };
+    Columns columns({"track", "holds", "stay", "moved", "trimmed", "split", "doubled", "in no cut", "new"},
+                    {1, 2, 3, 4, 5, 6, 7, 8});
+    for (const TrackComparison* const track : facts_.userTracks())
+        columns.measure(rowOf(*track));
+    out << columns.titleLine() << '\n';
+    for (const TrackComparison* const track : facts_.userTracks())
+        out << columns.lineOf(rowOf(*track)) << '\n';
+}
+
+void ApplyListing::printMoves(std::ostream& out) const
+{
+    const auto visitMoves = [this](const TrackComparison& track, auto visit) {
+        for (const Fate& fate : track.fates) {
+            if (fate.stays())
+                continue;
+            for (const Columns::Row& row : rowsOf(fate, clock_))
+                visit(row);
+        }
+        for (const Placement& placement : track.added)
+            visit(rowOfNew(placement, clock_));
+    };
+    Columns columns(MoveTitles);
+    for (const TrackComparison* const track : facts_.userTracks())
+        visitMoves(*track, [&](const Columns::Row& row) { columns.measure(row); });
+
+    printTrackTotals(out);
+    for (const TrackComparison* const track : facts_.userTracks()) {
+        if (countOf(*track).stay == track->fates.size() && track->added.empty())
+            continue;
+        out << '\n' << pathOf(*track->track) << "\n  " << columns.titleLine() << '\n';
+        visitMoves(*track, [&](const Columns::Row& row) { out << "  " << columns.lineOf(row) << '\n'; });
+    }
+}
+
+void ApplyListing::printMarkers(std::ostream& out) const
+{
+    const auto rowOf = [this](const Placement& marker) {
+        return Columns::Row{clock_.exactTimecode(marker.start), clock_.exactTimecode(marker.end),
+                            clock_.exactLength(marker.length()), printableName(marker.name, MostCharactersOfAMarker)};
+    };
+    Columns columns({"in", "out", "length", "marker"});
+    for (const TrackComparison* const track : facts_.markedTracks()) {
+        for (const Placement& marker : track->added)
+            columns.measure(rowOf(marker));
+    }
+    const char* separator = "";
+    for (const TrackComparison* const track : facts_.markedTracks()) {
+        out << separator << printableName(track->track->name()) << ", " << counted(track->added.size(), "marker")
+            << "\n  " << columns.titleLine() << '\n';
+        separator = "\n";
+        for (const Placement& marker : track->added)
+            out << "  " << columns.lineOf(rowOf(marker)) << '\n';
+    }
+}
+
+} // namespace cadrel::app

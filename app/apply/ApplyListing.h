@@ -1,0 +1,32 @@
+#pragma once
+
+#include "app/apply/ApplyFacts.h"
+#include "app/project/ProjectClock.h"
+
+#include <iosfwd>
+
+namespace cadrel::app {
+
+/// What a run did to a project, for people.
+class ApplyListing {
+public:
+    /// Both outlive the listing.
+    ApplyListing(const ApplyFacts& facts, const ProjectClock& clock) : facts_(facts), clock_(clock) {}
+
+    void printTotals(std::ostream& out) const;
+    /// A line for each track on which something lay, and then, track by track, one for all that isn't as it was.
+    void printMoves(std::ostream& out) const;
+    /// What the run marked, kind by kind.
+    void printMarkers(std::ostream& out) const;
+
+private:
+    void printPassedOver(std::ostream& out) const;
+    void printClips(std::ostream& out) const;
+    void printWritten(std::ostream& out) const;
+    void printTrackTotals(std::ostream& out) const;
+
+    const ApplyFacts& facts_;
+    const ProjectClock& clock_;
+};
+
+} // namespace cadrel::app

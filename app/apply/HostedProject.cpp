@@ -1,0 +1,86 @@
+#include "app/apply/HostedProject.h"
+
+#include "app/Failure.h"
+#include "app/Interruption.h"
+#include "app/Terminal.h"
+#include "app/project/ProjectAccess.h"
+#include "host/Host.h"
+#include "standin/file/ProjectFile.h"
+#include "standin/project/Project.h"
+#include "util/Result.h"
+
+#include <iostream>
+#include <string_view>
+
+namespace cadrel::app {
+
+using standin::ProjectFileError;
+using util::Result;
+
+namespace {
+
+/// Why a run can't begin.
+Failure startFailure(Result::Type result, const std::string& file)
+{
+    switch (result) {
+    case Result::NoTracks:
+        return {file, "has no tracks that a run could change", "give a project with sound"};
+    case Result::NoTracksSelected:
+        return {file, "no track is selected", "select the tracks in it, or give --tracks all"};
+    default:
+        return {file, "the run can't begin: failure " + std::to_string(result), "report it with the files"};
+    }
+}
+
+/// The name under which the user can undo what was done last; empty for nothing.
+std::u16string_view lastEntryOf(const standin::UndoList& undoList)
+{
+    return undoList.canUndo() ? undoList.nameAt(undoList.doneCount() - 1) : std::u16string_view();
+}
+
+} // namespace
+
+HostedProject::HostedProject(const std::string& file, const Terminal& terminal)
+    : file_(file), application_(standin::Terminal(std::cerr, terminal.showsProgress(), Interruption::request())),
+      host_(Velmark::makeCounted<host::Host>(application_.context()))
+{
+    requireReadableProject(file);
+    try {
+        project_ = &application_.openProject(file);
+    } catch (const ProjectFileError& error) {
+        throw readingFailure(error, file);
+    }
+    application_.activateProject(project_);
+}
+
+HostedProject::~HostedProject() = default;
+
+core::DataModel& HostedProject::model()
+{
+    return *host_->getProjectModel();
+}
+
+void HostedProject::apply()
+{
+    // A project can have been saved in the middle of a preview.
+    if (host_->isPreviewActive())
+        host_->setPreviewActive(false);
+    const Result::Type result = host_->startCadrel();
+    if (result != Result::Ok)
+        throw startFailure(result, file_);
+    application_.idle();
+    Interruption::check();
+    if (lastEntryOf(project_->undoList()) != u"Apply Cadrel")
+        throw Failure{file_, "the run broke off before its end", "report it with the files"};
+}
+
+void HostedProject::save(const std::string& file)
+{
+    try {
+        application_.saveProject(*project_, file);
+    } catch (const ProjectFileError& error) {
+        throw writingFailure(error, file);
+    }
+}
+
+} // namespace cadrel::app

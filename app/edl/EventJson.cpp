@@ -1,0 +1,59 @@
+#include "app/edl/EventJson.h"
+
+#include "core/EventList.h"
+#include "core/HealedEvent.h"
+
+namespace cadrel::app {
+
+using core::EventBase;
+using core::HealedEvent;
+using nlohmann::ordered_json;
+
+namespace {
+
+ordered_json toJson(const EventBase& event)
+{
+    ordered_json members = ordered_json::array();
+    if (const auto* healed = dynamic_cast<const HealedEvent*>(&event)) {
+        for (const auto& member : healed->healedEvents().events())
+            members.push_back(toJson(*member));
+    }
+    return {{"number", event.eventNumber()},
+            {"kind", event.eventKind()},
+            {"roll", event.rollName()},
+            {"clip", event.clipName()},
+            {"transition", event.transitionType()},
+            {"duration", event.transitionDuration()},
+            {"srcIn", event.srcIn().toString()},
+            {"srcOut", event.srcOut().toString()},
+            {"dstIn", event.dstIn().toString()},
+            {"dstOut", event.dstOut().toString()},
+            {"speed", event.motionSpeed()},
+            {"vfx", event.vfx()},
+            {"flaws", event.flaws()},
+            {"edlFile", event.edlFileName()},
+            {"members", std::move(members)}};
+}
+
+std::string textOf(const ordered_json& value)
+{
+    return value.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+}
+
+} // namespace
+
+void EventJson::write(Events events, const ordered_json& furtherKeys, const Sink& sink)
+{
+    sink("{\n\"events\": [");
+    const char* separator = "\n";
+    for (const auto& event : events) {
+        sink(separator + textOf(toJson(*event)));
+        separator = ",\n";
+    }
+    sink("\n]");
+    for (const auto& [key, value] : furtherKeys.items())
+        sink(",\n" + textOf(key) + ": " + textOf(value));
+    sink("\n}\n");
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,137 @@
+#include "app/edl/Generation.h"
+
+#include "app/Failure.h"
+#include "app/Paths.h"
+#include "app/Terminal.h"
+#include "app/Wording.h"
+#include "app/edl/GenerationFailure.h"
+#include "core/DataModel.h"
+#include "core/VfxNameMatcher.h"
+#include "util/Result.h"
+
+#include <cstddef>
+
+namespace cadrel::app {
+
+using core::DataModel;
+using core::EventBase;
+using core::EventList;
+using core::Settings;
+using core::VfxNameMatcher;
+using core::VfxPatternEntry;
+using util::Result;
+
+namespace {
+
+VfxPatternEntry vfxPatternOf(const std::string& text)
+{
+    const std::size_t comma = text.find(',');
+    if (comma == std::string::npos)
+        throw UsageError{"--vfx: \"" + text + "\" has no comma between the texts before and behind the version number"};
+    const std::string prefix = text.substr(0, comma);
+    const std::string postfix = text.substr(comma + 1);
+    try {
+        VfxNameMatcher().compile({{prefix, postfix}});
+    } catch (const Result::Type&) {
+        throw UsageError{prefix.empty() && postfix.empty()
+                             ? "--vfx: give a text before or behind the comma"
+                             : "--vfx: \"" + text + "\" may hold letters, digits and . * - _ alone"};
+    }
+    return {prefix, postfix, true};
+}
+
+std::string reasonFor(Result::Type result)
+{
+    switch (result) {
+    case Result::OutOfRange:
+        return "a time would fall outside the 24 hours of a day";
+    case Result::FrameOutOfRate:
+        return "a frame number is greater than the frame rate";
+    default:
+        return "failure " + std::to_string(result);
+    }
+}
+
+/// "event 005 of reel3.edl (A012C004)".
+std::string nameOf(const EventBase& event)
+{
+    return "event " + std::to_string(event.eventNumber()) + " of " + event.edlFileName() + " (" + event.rollName() +
+           ")";
+}
+
+Failure failureOf(const DataModel& model, Result::Type result, const GenerationOptions& options)
+{
+    const auto [newEvent, oldEvent] = findGenerationFailure(model);
+    const std::string reason = ": " + reasonFor(result);
+    const std::string remedy = "correct its timecodes or leave it out";
+    if (newEvent != nullptr && oldEvent != nullptr)
+        return {newEvent->edlFileName(), nameOf(*newEvent) + " can't be matched with " + nameOf(*oldEvent) + reason,
+                remedy};
+    if (newEvent != nullptr || oldEvent != nullptr) {
+        const EventBase& event = newEvent != nullptr ? *newEvent : *oldEvent;
+        return {event.edlFileName(), nameOf(event) + " can't be used" + reason, remedy};
+    }
+    return {joined(inputsOf(options)), "no change EDL can be made" + reason, "check the timecodes"};
+}
+
+/// Fills the change list. Throws Failure, also when nothing survives.
+void generate(DataModel& model, const GenerationOptions& options, Terminal& terminal)
+{
+    terminal.showProgress("generating the change EDL");
+    const Result::Type result = model.generateChangeEdl();
+    if (result != Result::Ok) {
+        terminal.showProgress("looking for the event on which it fails");
+        throw failureOf(model, result, options);
+    }
+    if (model.changeEdl().isEmpty())
+        throw Failure{joined(inputsOf(options)),
+                      "nothing of the old cut survives in the new one, so there is no change EDL",
+                      "see that both are of one reel, and try --match or --vfx"};
+}
+
+} // namespace
+
+std::vector<std::string> inputsOf(const GenerationOptions& options)
+{
+    std::vector<std::string> inputs = options.oldFiles;
+    inputs.insert(inputs.end(), options.newFiles.begin(), options.newFiles.end());
+    return inputs;
+}
+
+void configure(Settings& settings, const GenerationOptions& options)
+{
+    if (options.matchBy)
+        settings.setMatchBy(*options.matchBy);
+    if (options.healMode)
+        settings.setHealMode(*options.healMode);
+    settings.setBRollRenaming(options.load.renameBRolls);
+    if (options.vfxPatterns.empty())
+        return;
+    if (options.vfxPatterns.size() > Settings::VfxRowCount)
+        throw UsageError{"--vfx: can be given " + std::to_string(Settings::VfxRowCount) + " times at most"};
+    for (std::size_t row = 0; row < Settings::VfxRowCount; ++row)
+        settings.setVfxPattern(
+            row < options.vfxPatterns.size() ? vfxPatternOf(options.vfxPatterns[row]) : VfxPatternEntry(), row);
+}
+
+std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)
+{
+    std::vector<std::string> names;
+    for (LoadedEdl& edl : loader.load(files)) {
+        EdlLoader::refuseUnreadable(edl);
+        events.append(edl.events.release());
+        names.push_back(fileNameOf(edl.path));
+    }
+    return names;
+}
+
+Cuts generateChangeEdl(DataModel& model, const GenerationOptions& options, Terminal& terminal)
+{
+    const EdlLoader loader(options.load, terminal);
+    const Cuts cuts{loadEvents(loader, options.oldFiles, model.oldEdl()),
+                    loadEvents(loader, options.newFiles, model.newEdl())};
+    generate(model, options, terminal);
+    return cuts;
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,48 @@
+#pragma once
+
+#include "app/edl/EdlLoader.h"
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace cadrel::core {
+class DataModel;
+class Settings;
+} // namespace cadrel::core
+
+namespace cadrel::app {
+
+class Terminal;
+
+/// What a change EDL is made of, and how.
+struct GenerationOptions {
+    std::vector<std::string> oldFiles;
+    std::vector<std::string> newFiles;
+    LoadOptions load;
+    std::optional<std::int32_t> matchBy; ///< nothing: what the settings of the model say, here and for the healing
+    std::optional<std::int32_t> healMode;
+    std::vector<std::string> vfxPatterns; ///< "PREFIX,POSTFIX"; none: those of the settings
+};
+
+/// The names of the files that were read.
+struct Cuts {
+    std::vector<std::string> oldNames;
+    std::vector<std::string> newNames;
+};
+
+/// The files of both cuts.
+std::vector<std::string> inputsOf(const GenerationOptions& options);
+
+/// Puts the options into the settings. Throws UsageError for a VFX pattern that can't be one.
+void configure(core::Settings& settings, const GenerationOptions& options);
+
+/// Puts the events of the files into the list; returns the names of the files. Throws Failure.
+std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files,
+                                    core::EventList& events);
+
+/// Reads both cuts into the model and makes the change EDL by its settings. Throws Failure, also when nothing survives.
+Cuts generateChangeEdl(core::DataModel& model, const GenerationOptions& options, Terminal& terminal);
+
+} // namespace cadrel::app

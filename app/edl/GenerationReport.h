@@ -1,0 +1,45 @@
+#pragma once
+
+#include "app/edl/Coverage.h"
+#include "app/edl/Generation.h"
+#include "core/Framerate.h"
+
+#include <nlohmann/json.hpp>
+#include <string>
+#include <vector>
+
+namespace cadrel::core {
+class DataModel;
+} // namespace cadrel::core
+
+namespace cadrel::app {
+
+/// What there is to tell about a change EDL that was made of two cuts, for people and for programs.
+class GenerationReport {
+public:
+    /// The model holds both cuts and the change EDL, and outlives the report.
+    GenerationReport(const core::DataModel& model, Cuts cuts, const core::Framerate& framerate);
+
+    /// "Old cut", "New cut" and "Frame rate" with what is told about it, a line each.
+    std::string cutsText(const std::string& rate) const;
+    /// "Change EDL" and "Covered".
+    std::string changeText() const;
+    std::string insertsText() const;
+    /// {"old": {...}, "new": {...}, "healed": {...}, "programmeFrames": ..., "coveredFrames": ..., "inserts": [...]}
+    nlohmann::ordered_json toJson() const;
+
+private:
+    std::string timecode(std::int32_t frames) const;
+
+    const core::DataModel& model_;
+    Cuts cuts_;
+    core::Framerate framerate_;
+    std::size_t healedEvents_ = 0;  ///< events that stand for several
+    std::size_t healedMembers_ = 0; ///< those that they stand for
+    Coverage coverage_;
+};
+
+/// The names of EDL files and what is in them: "a.edl, b.edl: 12 events, all valid".
+std::string describeEvents(const core::EventList& events, const std::vector<std::string>& names);
+
+} // namespace cadrel::app

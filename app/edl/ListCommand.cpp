@@ -1,0 +1,126 @@
+#include "app/edl/ListCommand.h"
+
+#include "app/Failure.h"
+#include "app/Interruption.h"
+#include "app/JsonOutput.h"
+#include "app/Paths.h"
+#include "app/Terminal.h"
+#include "app/Wording.h"
+#include "app/edl/EventJson.h"
+#include "app/edl/EventTable.h"
+#include "app/edl/ProjectFramerate.h"
+#include "core/EventBase.h"
+#include "core/Timecode.h"
+
+#include <array>
+#include <cstddef>
+#include <iostream>
+#include <list>
+#include <memory>
+#include <optional>
+#include <string_view>
+
+namespace cadrel::app {
+
+using core::EventBase;
+using core::Timecode;
+
+namespace {
+
+struct Totals {
+    std::size_t events = 0;
+    std::size_t invalid = 0;
+    std::array<std::size_t, 3> byTransition{}; ///< by TransitionType
+    std::size_t retimed = 0;                   ///< of the valid events
+    std::optional<Timecode> start;             ///< of the valid events
+    std::optional<Timecode> end;
+
+    void count(const EventBase& event)
+    {
+        ++events;
+        ++byTransition.at(static_cast<std::size_t>(event.transitionType()));
+        if (!event.isValid()) {
+            ++invalid;
+            return;
+        }
+        retimed += event.isNormalSpeed() ? 0U : 1U;
+        if (!start || event.dstIn() < *start)
+            start = event.dstIn();
+        if (!end || event.dstOut() > *end)
+            end = event.dstOut();
+    }
+};
+
+Totals totalsOf(const std::list<LoadedEdl>& edls)
+{
+    Totals totals;
+    for (const LoadedEdl& edl : edls) {
+        for (const auto& event : edl.events.events())
+            totals.count(*event);
+    }
+    return totals;
+}
+
+std::string toText(const Totals& totals, const std::string& rate)
+{
+    std::string text = "Events      " + std::to_string(totals.events) + ", " +
+                       (totals.invalid == 0 ? "all valid" : std::to_string(totals.invalid) + " invalid") + "\n" +
+                       "            " + counted(totals.byTransition[0], "cut") + ", " +
+                       counted(totals.byTransition[1], "dissolve") + ", " + counted(totals.byTransition[2], "wipe") +
+                       ", " + std::to_string(totals.retimed) + " retimed\n";
+    if (totals.start)
+        text += "Programme   " + totals.start->toString() + " - " + totals.end->toString() + ", " +
+                (*totals.end - *totals.start).toString() + " long\n";
+    return text + "Frame rate  " + rate + "\n";
+}
+
+std::vector<std::shared_ptr<EventBase>> allEvents(const std::list<LoadedEdl>& edls)
+{
+    std::vector<std::shared_ptr<EventBase>> events;
+    for (const LoadedEdl& edl : edls)
+        events.insert(events.end(), edl.events.events().begin(), edl.events.events().end());
+    return events;
+}
+
+void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const std::string& path)
+{
+    std::vector<std::string> names;
+    for (const LoadedEdl& edl : edls)
+        names.push_back(fileNameOf(edl.path));
+    std::optional<Interruption> interruption;
+    if (!JsonOutput::isStandardOutput(path))
+        interruption.emplace();
+    JsonOutput json(path);
+    EventJson::write(allEvents(edls), {{"files", names}, {"rate", rate}},
+                     [&json](std::string_view text) { json.write(text); });
+    json.finish();
+    json.keep();
+}
+
+} // namespace
+
+void runList(const ListOptions& options, Terminal& terminal)
+{
+    const bool jsonOnly = JsonOutput::isStandardOutput(options.jsonFile);
+    if (!options.jsonFile.empty() && !jsonOnly)
+        refuseToOverwrite(options.files, options.jsonFile);
+    const EdlLoader loader(options.load, terminal);
+    const ProjectFramerate rate(loader.chooseRate(options.files.front()));
+    const std::string label = ProjectFramerate::labelOf(rate.getFramerate());
+    // Taking a long list apart event by event takes a quarter of the whole time; the end of the program does it at once.
+    static const auto& edls = *new std::list<LoadedEdl>(loader.load(options.files));
+
+    terminal.clearProgress();
+    if (!options.jsonFile.empty())
+        writeJson(edls, label, options.jsonFile);
+    if (jsonOnly)
+        return;
+    if (!options.summary) {
+        EventTable(allEvents(edls), Terminal::wantsColour()).print(std::cout);
+        std::cout << '\n';
+    }
+    std::cout << toText(totalsOf(edls), label);
+    flushStandardOutput();
+}
+
+} // namespace cadrel::app

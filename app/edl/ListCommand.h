@@ -1,0 +1,22 @@
+#pragma once
+
+#include "app/edl/EdlLoader.h"
+
+#include <string>
+#include <vector>
+
+namespace cadrel::app {
+
+class Terminal;
+
+struct ListOptions {
+    std::vector<std::string> files;
+    std::string jsonFile; ///< empty: none is written; "-": standard output
+    bool summary = false; ///< the totals alone
+    LoadOptions load;
+};
+
+/// `cadrel list`: shows the events of EDLs and what is wrong with them. Throws Failure and UsageError.
+void runList(const ListOptions& options, Terminal& terminal);
+
+} // namespace cadrel::app

@@ -1,0 +1,39 @@
+#include "app/edl/ProjectFramerate.h"
+
+#include "core/Timecode.h"
+
+#include <algorithm>
+
+namespace cadrel::app {
+
+using core::Framerate;
+using core::Timecode;
+
+ProjectFramerate::ProjectFramerate(const Framerate& framerate) : framerate_(framerate)
+{
+    Timecode::setFramerateProvider(this);
+}
+
+ProjectFramerate::~ProjectFramerate()
+{
+    Timecode::setFramerateProvider(nullptr);
+}
+
+std::optional<Framerate> ProjectFramerate::fromShownRate(const Framerate& shown)
+{
+    if (shown.framesPerSecond == 0)
+        return std::nullopt;
+    return Framerate(shown.framesPerSecond, shown.dropFrame == 1 ? 1 : 0);
+}
+
+std::string ProjectFramerate::labelOf(const Framerate& framerate)
+{
+    const auto label = std::find_if(Labels.begin(), Labels.end(), [&framerate](std::string_view candidate) {
+        const Framerate other = Framerate::fromLabel(candidate);
+        return other.framesPerSecond == framerate.framesPerSecond && other.pulledDown == framerate.pulledDown &&
+               other.dropFrame == framerate.dropFrame;
+    });
+    return label == Labels.end() ? std::to_string(framerate.framesPerSecond) + " fps" : std::string(*label);
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,57 @@
+#include "app/project/ProjectAccess.h"
+
+#include "app/Paths.h"
+#include "standin/file/ProjectFile.h"
+#include "standin/project/Project.h"
+#include "util/Result.h"
+
+#include <filesystem>
+#include <system_error>
+#include <unistd.h>
+
+namespace cadrel::app {
+
+using standin::ProjectFileError;
+
+namespace {
+
+/// The fault alone: the error begins with the name of the file, in as many bytes, as a failure does.
+std::string faultIn(const ProjectFileError& error, const std::string& file)
+{
+    const std::string text = error.what();
+    const bool hasName = text.size() > file.size() && text.compare(file.size(), 2, ": ") == 0;
+    return hasName ? text.substr(file.size() + 2) : text;
+}
+
+} // namespace
+
+void requireReadableProject(const std::string& file)
+{
+    toWide(file);
+    std::error_code ignored;
+    if (!std::filesystem::is_regular_file(file, ignored) || access(file.c_str(), R_OK) != 0)
+        throw unreadable(file, FileKind::Project);
+}
+
+Failure readingFailure(const ProjectFileError& error, const std::string& file)
+{
+    return {file, faultIn(error, file), "take an intact copy, or the version of Cadrel that wrote it"};
+}
+
+Failure writingFailure(const ProjectFileError& error, const std::string& file)
+{
+    const std::string fault = faultIn(error, file);
+    // Why a file can't be written the file system tells better.
+    return fault == "can't be written" ? unwritable({file}) : Failure{file, fault, "correct the project"};
+}
+
+ProjectClock clockOf(const standin::Project& project, const std::string& file)
+{
+    try {
+        return {project.frameRate(), project.timeOrigin()};
+    } catch (const util::Result::Type&) {
+        throw Failure{file, "has a frame rate at which no timecode counts", "correct the rate"};
+    }
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,142 @@
+#include "app/project/ShowCommand.h"
+
+#include "app/Failure.h"
+#include "app/Interruption.h"
+#include "app/JsonOutput.h"
+#include "app/Paths.h"
+#include "app/Printable.h"
+#include "app/Terminal.h"
+#include "app/Wording.h"
+#include "app/project/ProjectAccess.h"
+#include "app/project/ProjectClock.h"
+#include "app/project/ProjectContent.h"
+#include "app/project/ProjectJson.h"
+#include "app/project/ProjectListing.h"
+#include "standin/file/ProjectFile.h"
+#include "standin/file/Utf16.h"
+#include "standin/project/Project.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <iostream>
+#include <iterator>
+#include <optional>
+#include <string_view>
+#include <vector>
+
+namespace cadrel::app {
+
+using standin::Project;
+using standin::ProjectFile;
+using standin::ProjectFileError;
+using standin::toUtf8;
+using standin::Track;
+
+namespace {
+
+/// More names don't help to find the right one.
+constexpr std::size_t MostNamesInAMessage = 40;
+constexpr std::size_t MostCharactersOfAName = 40;
+
+Project& read(const std::string& file, Terminal& terminal)
+{
+    // A long project is taken apart node by node; the end of the program does it at once.
+    static standin::ChangeLog& log = *new standin::ChangeLog;
+    static Project* project = nullptr;
+
+    requireReadableProject(file);
+    terminal.showProgress("reading " + fileNameOf(file));
+    try {
+        project = ProjectFile::read(file, log).detach();
+    } catch (const ProjectFileError& error) {
+        throw readingFailure(error, file);
+    }
+    return *project;
+}
+
+bool isNamed(const Track& track, const std::string& name)
+{
+    return toUtf8(track.name()) == name;
+}
+
+/// The tracks of that name; a folder stands for all that is in it, too.
+Tracks tracksNamed(Project& project, const ShowOptions& options)
+{
+    Tracks tracks = tracksOf(project);
+    const std::string& name = options.trackName;
+    if (name.empty())
+        return tracks;
+    Tracks found;
+    std::copy_if(tracks.begin(), tracks.end(), std::back_inserter(found), [&name](const Track* track) {
+        const Tracks folders = foldersAround(*track);
+        return isNamed(*track, name) || std::any_of(folders.begin(), folders.end(),
+                                                    [&name](const Track* folder) { return isNamed(*folder, name); });
+    });
+    if (!found.empty())
+        return found;
+    std::vector<std::string> names;
+    for (const Track* track : tracks) {
+        if (names.size() == MostNamesInAMessage) {
+            names.push_back(std::string("and ") + std::to_string(tracks.size() - names.size()) + " more");
+            break;
+        }
+        names.push_back(quoted(toPrintable(toUtf8(track->name()), MostCharactersOfAName).text));
+    }
+    throw Failure{options.projectFile, "has no track " + quoted(name),
+                  names.empty() ? "it has no tracks at all" : "give one of " + joined(names)};
+}
+
+void writeJson(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
+{
+    std::optional<Interruption> interruption;
+    if (!JsonOutput::isStandardOutput(options.jsonFile))
+        interruption.emplace();
+    JsonOutput json(options.jsonFile);
+    ProjectJson(project, clock, [&json](std::string_view text) {
+        json.write(text);
+    }).write(fileNameOf(options.projectFile), tracks);
+    json.finish();
+    json.keep();
+}
+
+void print(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
+{
+    const ProjectListing listing(project, clock, Terminal::wantsColour());
+    if (!options.trackName.empty()) {
+        listing.printContent(std::cout, tracks);
+        return;
+    }
+    listing.printFacts(std::cout, fileNameOf(options.projectFile));
+    if (!tracks.empty()) {
+        std::cout << '\n';
+        listing.printTree(std::cout);
+        std::cout << '\n';
+        listing.printContent(std::cout, tracks);
+    }
+    if (!project.pool().clips().empty()) {
+        std::cout << '\n';
+        listing.printPool(std::cout);
+    }
+}
+
+} // namespace
+
+void runShow(const ShowOptions& options, Terminal& terminal)
+{
+    const bool jsonOnly = JsonOutput::isStandardOutput(options.jsonFile);
+    if (!options.jsonFile.empty() && !jsonOnly)
+        refuseToOverwrite({options.projectFile}, options.jsonFile);
+    Project& project = read(options.projectFile, terminal);
+    const ProjectClock clock = clockOf(project, options.projectFile);
+    const Tracks tracks = tracksNamed(project, options);
+
+    terminal.clearProgress();
+    if (!options.jsonFile.empty())
+        writeJson(project, clock, tracks, options);
+    if (jsonOnly)
+        return;
+    print(project, clock, tracks, options);
+    flushStandardOutput();
+}
+
+} // namespace cadrel::app
