@@ -13,7 +13,6 @@
 #include "host/VideoProvider.h"
 #include "util/StringUtil.h"
 
-#include <algorithm>
 #include <utility>
 
 using namespace Velmark;
@@ -133,8 +132,10 @@ void Host::setCurrentProject(Project* project)
 {
     // Nothing is left behind half: the window follows whatever fails.
     FirstFailure failure;
-    if (m_currentProject != project)
+    if (m_currentProject != project) {
         clearRequests();
+        m_restorePreviewState = false;
+    }
     if (m_currentProject)
         m_currentProject->model().setNotifier(nullptr);
     m_currentProject = project;
@@ -152,7 +153,6 @@ void Host::clearRequests()
 {
     m_runRequested = false;
     m_previewRequested = false;
-    m_restorePreviewState = false;
 }
 
 int32 Host::projectClosing(IProjectDocument* project, int32 /*reserved*/)
@@ -164,7 +164,7 @@ void Host::close(IProjectDocument* document)
 {
     const auto found = m_projects.find(document);
     if (found == m_projects.end())
-        throw Result::HostObjectMissing;
+        return;
     found->second.registration.run();
     if (found->second.project.get() == m_currentProject)
         projectDeactivated(document);
@@ -196,7 +196,7 @@ int32 Host::update(FUnknown* changed, int32 /*message*/)
         const FramerateScope rate(*project);
         project->onProjectChanged();
         if (project == m_currentProject && std::exchange(m_modelReplaced, false))
-            unlockAfterUndo(*project);
+            settleAfterUndo(*project);
     });
 }
 
@@ -207,16 +207,18 @@ void Host::notify(const core::ChangeContext& context)
     ChangeContextNotificationBase::notify(context);
 }
 
-/// Takes the locks of a preview that is no longer, since nothing else would.
-void Host::unlockAfterUndo(Project& project)
+/// A preview that has come back has to know its tracks again. One that has gone would leave them locked and the user at its
+/// place, and the next would take that for the user's own.
+void Host::settleAfterUndo(Project& project)
 {
-    if (project.model().isPreviewActive())
+    project.findLockedTracks();
+    if (project.model().isPreviewActive() || !project.hasLockTracks())
         return;
-    const std::vector<Track> tracks = project.cadrelTracks();
-    if (std::ranges::none_of(tracks, [](const Track& track) { return track.hasLockState(); }))
-        return;
-    project.setTracksLocked(false);
+    FirstFailure failure;
+    failure.ofStep([&] { restoreCycles(); });
+    failure.ofStep([&] { project.setTracksLocked(false); });
     project.releaseLockTracks();
+    failure.raise();
 }
 
 int32 Host::projectEdited(IProjectDocument* project, IEditTransaction* transaction)

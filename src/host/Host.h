@@ -22,6 +22,10 @@
 #include <optional>
 #include <string>
 
+namespace Velmark {
+class IActionManager;
+} // namespace Velmark
+
 namespace cadrel::host {
 
 class Project;
@@ -75,16 +79,19 @@ public:
     Velmark::int32 projectEdited(Velmark::IProjectDocument* project, Velmark::IEditTransaction* transaction) override;
     Velmark::int32 onIdle() override;
 
-    /// A model that an undo has brought back may want the tracks unlocked; see update().
+    /// A model that an undo has brought back may have no preview any more; see update().
     void notify(const core::ChangeContext& context) override;
 
     // What the window calls.
 
+    /// All that keeps a run or a preview from being requested is answered, and nothing is thrown; what was requested before
+    /// stays as it is.
     util::Result::Type startCadrel() override;
     util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                     std::uint32_t options) override;
-    /// Result::NoProject without a project; Result::InvalidArgument when there are no events besides the neighbours or none
-    /// of them has valid times.
+    /// Result::Ok for no events, Result::InvalidArgument for more neighbours than events, Result::NoProject without a
+    /// project, and Result::NotAvailable for the destination of a project that has no preview offset. Throws
+    /// Result::InvalidArgument when there are no events besides the neighbours or none of them has valid times.
     util::Result::Type cycleToEvents(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                      std::uint32_t options) override;
     util::Result::Type getProjectCycle(double& left, double& right) override;
@@ -151,7 +158,7 @@ private:
     Project* find(Velmark::IProjectDocument* document) const;
     void setCurrentProject(Project* project);
     void clearRequests();
-    void unlockAfterUndo(Project& project);
+    void settleAfterUndo(Project& project);
     static void showAlert(const std::wstring& message);
 
     // Runs and previews, in HostRuns.cpp.
@@ -165,12 +172,12 @@ private:
     /// Carries out steps as one entry of the undo list. What they throw is the result, and the name of the entry says so.
     util::Result::Type edit(const EntryName& name, const std::function<void(Velmark::IEditTransaction&)>& steps);
     util::Result::Type commit(const char16_t* name);
-    void takeBack();
+    void takeBack(Velmark::IActionManager& actions);
     void restoreCycles();
     void keepCycles();
-    void joinPieces(Velmark::IEditTransaction& transaction, double start, double end);
-    /// Where a run may begin: makes sure that there is a preview offset before canStart is asked.
-    util::Result::Type prepareStart();
+    void joinPieces(double start, double end);
+    /// Makes sure that there is a preview offset, and throws what keeps a run from beginning.
+    void prepareStart();
     static void ensurePreviewOffset(Project& project);
     /// The one that is open.
     Velmark::IEditTransaction& openTransaction() const;

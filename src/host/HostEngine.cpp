@@ -168,7 +168,7 @@ std::uint64_t Host::estimateSteps(std::uint64_t eventCount, const core::Settings
 {
     if (!m_currentProject)
         return 0;
-    const std::vector<Track> candidates = m_currentProject->cadrelTracks();
+    const std::vector<Track> candidates = m_currentProject->availableTracks();
     const bool onlySelected = settings.applyTo() == core::ApplyTo::SelectedTracks;
     const auto tracks = static_cast<std::uint64_t>(
         std::ranges::count_if(candidates, [&](const Track& track) { return !onlySelected || track.isSelected(); }));

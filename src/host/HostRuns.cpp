@@ -33,14 +33,6 @@ bool isOnlySelected(const core::Settings& settings)
     return settings.applyTo() == core::ApplyTo::SelectedTracks;
 }
 
-std::vector<Track> runTracks(Project& project)
-{
-    std::vector<Track> tracks = project.cadrelTracks();
-    if (isOnlySelected(project.model().settings()))
-        std::erase_if(tracks, [](const Track& track) { return !track.isSelected(); });
-    return tracks;
-}
-
 } // namespace
 
 const Host::EntryName Host::Apply{u"Apply Cadrel", u"Apply Cadrel (incomplete)"};
@@ -85,38 +77,37 @@ int32 Host::onIdle()
 
 Result::Type Host::startCadrel()
 {
-    const Result::Type result = prepareStart();
-    if (result == Result::Ok)
+    return resultOf([this] {
+        prepareStart();
         m_runRequested = true;
-    return result;
+    });
 }
 
 Result::Type Host::startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                 std::uint32_t options)
 {
-    const Result::Type result = prepareStart();
-    if (result != Result::Ok)
-        return result;
-    m_previewEvents.copyFrom(events);
-    m_previewFirst = first;
-    m_previewLast = last;
-    m_previewOptions = options;
-    core::DataModel& model = m_currentProject->model();
-    std::optional<LoweredPreviewFlag> lowered;
-    if (std::exchange(m_restorePreviewState, false))
-        lowered.emplace(model);
-    m_modelSnapshot = DataModelEditStep::snapshotOf(model);
-    m_previewRequested = true;
-    return Result::Ok;
+    return resultOf([&] {
+        prepareStart();
+        core::DataModel& model = m_currentProject->model();
+        std::optional<LoweredPreviewFlag> lowered;
+        if (m_restorePreviewState)
+            lowered.emplace(model);
+        core::serialize::ByteArchive snapshot = DataModelEditStep::snapshotOf(model);
+        m_previewEvents.copyFrom(events);
+        m_modelSnapshot = std::move(snapshot);
+        m_previewFirst = first;
+        m_previewLast = last;
+        m_previewOptions = options;
+        m_restorePreviewState = false;
+        m_previewRequested = true;
+    });
 }
 
-Result::Type Host::prepareStart()
+void Host::prepareStart()
 {
-    const Result::Type result = resultOf([this] {
-        if (m_currentProject)
-            ensurePreviewOffset(*m_currentProject);
-    });
-    return result == Result::Ok ? canStart() : result;
+    if (m_currentProject)
+        ensurePreviewOffset(*m_currentProject);
+    requireSuccess(canStart());
 }
 
 void Host::ensurePreviewOffset(Project& project)
@@ -127,14 +118,18 @@ void Host::ensurePreviewOffset(Project& project)
 
 Result::Type Host::canStart()
 {
-    if (!m_currentProject)
-        return Result::NoProject;
-    core::DataModel& model = m_currentProject->model();
-    if (model.changeEdl().isEmpty())
-        return Result::ChangeEdlEmpty;
-    if (m_currentProject->cadrelTracks().empty())
-        return Result::NoTracks;
-    return runTracks(*m_currentProject).empty() ? Result::NoTracksSelected : Result::Ok;
+    return resultOf([this] {
+        if (!m_currentProject)
+            throw Result::NoProject;
+        core::DataModel& model = m_currentProject->model();
+        if (model.changeEdl().isEmpty())
+            throw Result::ChangeEdlEmpty;
+        const std::vector<Track> tracks = m_currentProject->availableTracks();
+        if (tracks.empty())
+            throw Result::NoTracks;
+        if (isOnlySelected(model.settings()) && std::ranges::none_of(tracks, &Track::isSelected))
+            throw Result::NoTracksSelected;
+    });
 }
 
 Result::Type Host::runCadrel()
@@ -144,26 +139,28 @@ Result::Type Host::runCadrel()
     Project& project = *m_currentProject;
     const core::EventList& changeList = project.model().changeEdl();
     return withProgress({L"Processing Project", true}, changeList.size(), [&] {
-        bool isCancelled = false;
+        Counted<IActionManager> actions; // once the user has cancelled
         const Result::Type result = edit(Apply, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle);
             project.createMarkerTracks(transaction);
             const Result::Type ran = run(changeList);
-            isCancelled = ran == Result::Cancelled;
-            if (isCancelled)
+            if (ran == Result::Cancelled) {
+                // Where it can't be undone it stays, and mustn't look done.
+                actions = required(service<IActionManager>(m_context));
                 return;
+            }
             requireSuccess(ran);
             project.createVideoTracks(transaction);
             m_videoProvider->apply(true, transaction, 0.0);
             double start = 0.0;
             double end = 0.0;
             project.getApplyRange(start, end);
-            joinPieces(transaction, start, end);
+            joinPieces(start, end);
         });
-        if (isCancelled)
-            takeBack();
         requireSuccess(result);
+        if (actions)
+            takeBack(*actions);
     });
 }
 
@@ -183,7 +180,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
             const double offset = project.previewOffset();
             m_videoProvider->apply(true, transaction, offset);
             // Without material in the preview the project ends before it.
-            joinPieces(transaction, offset, std::max(offset, project.projectEnd()));
+            joinPieces(offset, std::max(offset, project.projectEnd()));
             project.previewEvents().copyFrom(events);
         }));
         project.collectLockTracks();
@@ -249,8 +246,15 @@ Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTra
         steps(*m_transaction);
     });
     if (m_transaction) {
-        if (previewed.events() != previewedBefore)
-            m_transaction->addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get());
+        const Result::Type kept = resultOf([&] {
+            if (previewed.events() != previewedBefore)
+                requireOk(m_transaction->addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get()));
+        });
+        // No memo is carried over rather than to the wrong place.
+        if (kept != Result::Ok)
+            previewed.clear();
+        if (result == Result::Ok)
+            result = kept;
         if (result == Result::Ok)
             result = commit(name.done);
         if (result != Result::Ok)
@@ -268,24 +272,22 @@ Result::Type Host::commit(const char16_t* name)
 }
 
 /// Undoes the run that the user has cancelled.
-void Host::takeBack()
+void Host::takeBack(IActionManager& actions)
 {
     // The undo removes tracks that it holds.
     m_currentProject->setUseTrackCache(false);
-    const auto actions = required(service<IActionManager>(m_context));
-    requireOk(actions->invoke(IActionManager::EditCategory, IActionManager::Undo, 0));
+    requireOk(actions.invoke(IActionManager::EditCategory, IActionManager::Undo, 0));
 }
 
 /// Joins what a run has split and put together again.
-void Host::joinPieces(IEditTransaction& transaction, double start, double end)
+void Host::joinPieces(double start, double end)
 {
-    m_currentProject->closeRange(transaction, isOnlySelected(m_currentProject->model().settings()), start, end);
+    m_currentProject->closeRange(isOnlySelected(m_currentProject->model().settings()), start, end);
 }
 
 Result::Type Host::endPreview()
 {
-    m_runRequested = false;
-    m_previewRequested = false;
+    clearRequests();
     std::optional<LoweredPreviewFlag> lowered;
     if (m_currentProject && m_restorePreviewState)
         lowered.emplace(m_currentProject->model());
@@ -300,8 +302,10 @@ void Host::setPreviewActive(bool active)
     core::DataModel& model = project.model();
     const bool wasActive = model.isPreviewActive();
     FirstFailure failure;
-    if (!active)
+    if (!active) {
         clearRequests();
+        m_restorePreviewState = false;
+    }
     if (wasActive && !active) {
         failure.ofStep([&] { restoreCycles(); });
         failure.ofStep([&] { requireSuccess(finishPreview(EndPreview)); });
@@ -327,17 +331,30 @@ void Host::keepCycles()
 {
     using Key = core::PropertyKey;
     core::DataModel& model = m_currentProject->model();
+    // What can't be read isn't restored, least of all as it was before an earlier preview.
+    for (const std::int32_t key : {Key::ProjectCycleLeft, Key::ProjectCycleRight, Key::TransportCycleLower,
+                                   Key::TransportCycleUpper, Key::TransportPosition})
+        model.removeProperty(key);
+    const auto keep = [&](std::int32_t key, double value) { model.setProperty(key, core::Variant(value)); };
     double left = 0.0;
     double right = 0.0;
-    getProjectCycle(left, right);
-    model.setProperty(Key::ProjectCycleLeft, core::Variant(left));
-    model.setProperty(Key::ProjectCycleRight, core::Variant(right));
-    getTransportCycle(left, right);
-    model.setProperty(Key::TransportCycleLower, core::Variant(std::min(left, right)));
-    model.setProperty(Key::TransportCycleUpper, core::Variant(std::max(left, right)));
     double position = 0.0;
-    getTransportPosition(position);
-    model.setProperty(Key::TransportPosition, core::Variant(position));
+    FirstFailure failure;
+    failure.ofStep([&] {
+        getProjectCycle(left, right);
+        keep(Key::ProjectCycleLeft, left);
+        keep(Key::ProjectCycleRight, right);
+    });
+    failure.ofStep([&] {
+        getTransportCycle(left, right);
+        keep(Key::TransportCycleLower, std::min(left, right));
+        keep(Key::TransportCycleUpper, std::max(left, right));
+    });
+    failure.ofStep([&] {
+        getTransportPosition(position);
+        keep(Key::TransportPosition, position);
+    });
+    failure.raise();
 }
 
 void Host::restoreCycles()

@@ -8,7 +8,7 @@
 #include "velmark/ClassId.h"
 #include "velmark/Context.h"
 
-#include <cmath>
+#include <algorithm>
 
 using namespace Velmark;
 
@@ -25,12 +25,14 @@ void Marker::insertInto(IHostContext* context, IEditTransaction& transaction, co
 {
     if (!track.isAlive())
         throw util::Result::NotAvailable;
-    const bool isRange = isBefore(LongestPoint, std::abs(end - start));
+    // A host refuses an event that ends before it starts, and one change event would end the whole run.
+    const auto [first, last] = std::minmax(start, end);
+    const bool isRange = isBefore(LongestPoint, last - first);
     HostEvent marker(track,
                      required(create<IProjectNode>(context, isRange ? ClassId::RangeMarker : ClassId::PointMarker)));
-    marker.setStart(transaction, start);
+    marker.setStart(transaction, first);
     if (isRange)
-        marker.setEnd(transaction, end);
+        marker.setEnd(transaction, last);
     requireOk(transaction.insert(track.container().get(), marker.node()));
     marker.setName(transaction, name);
     requireOk(marker.node()->setAttribute(AttributeKey::Reel, FVariant::string(reel.c_str()), true));

@@ -12,7 +12,7 @@ namespace cadrel::host {
 
 class Track;
 
-/// A marker that is about to be written. Times are those of the project's clock, in seconds.
+/// A marker that is about to be written. Times are those of the project's clock, in seconds, and may be reversed.
 struct Marker {
     double start = 0.0;
     double end = 0.0; ///< one that is no longer than a hundredth of a second becomes a point

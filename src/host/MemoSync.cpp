@@ -38,6 +38,11 @@ std::vector<SecondsRange> without(const std::vector<SecondsRange>& ranges, const
     return left;
 }
 
+bool reachesInto(const HostEvent& memo, const SecondsRange& range)
+{
+    return isBefore(memo.getStart(), range.end) && isBefore(range.start, memo.getEnd());
+}
+
 bool hasId(const std::vector<HostEvent>& memos, std::int64_t id)
 {
     return std::ranges::any_of(memos, [id](const HostEvent& memo) { return memo.getUserId() == id; });
@@ -118,32 +123,64 @@ MemoSync::Memo MemoSync::memoOf(const HostEvent& event)
     return {event.getUserId(), event.getName(), event.getStart(), event.getEnd()};
 }
 
+const MemoSync::Memo* MemoSync::findById(const Memos& memos, std::int64_t id)
+{
+    const auto found = std::ranges::find(memos, id, &Memo::id);
+    return found != memos.end() ? &*found : nullptr;
+}
+
+MemoSync::Preview MemoSync::previewOf(const Track& memos) const
+{
+    Preview preview;
+    const Events& events = m_project.previewEvents().events();
+    for (std::size_t index = 0; index < events.size(); ++index) {
+        for (const Stretch& stretch : stretchesOf(m_project, events, index))
+            preview.shown.push_back({events[index], stretch, {}});
+    }
+
+    preview.adrift = memos.clipEvents();
+    std::erase_if(preview.adrift, [offset = m_project.previewOffset()](const HostEvent& memo) {
+        return isBefore(memo.getEnd(), offset);
+    });
+    const auto give = [&preview](Shown& shown, const auto& belongs) {
+        std::erase_if(preview.adrift, [&](const HostEvent& memo) {
+            if (!belongs(memo))
+                return false;
+            shown.copies.push_back(memo);
+            return true;
+        });
+    };
+    for (Shown& shown : preview.shown) {
+        const std::vector<HostEvent> inside = memosIn(memos, shown.stretch.preview);
+        give(shown, [&](const HostEvent& memo) { return std::ranges::find(inside, memo) != inside.end(); });
+    }
+    for (Shown& shown : preview.shown)
+        give(shown, [&](const HostEvent& memo) { return reachesInto(memo, shown.stretch.preview); });
+    return preview;
+}
+
 void MemoSync::remember(const Track& memos)
 {
-    const Events& events = m_project.previewEvents().events();
     m_remembered.clear();
-    for (std::size_t index = 0; index < events.size(); ++index) {
-        Memos& copies = m_remembered[events[index]];
-        for (const Stretch& stretch : stretchesOf(m_project, events, index))
-            std::ranges::transform(memosIn(memos, stretch.preview), std::back_inserter(copies), memoOf);
-    }
+    for (const Shown& shown : previewOf(memos).shown)
+        std::ranges::transform(shown.copies, std::back_inserter(m_remembered[shown.event]), memoOf);
 }
 
 void MemoSync::follow(const Track& memos, IEditTransaction& transaction)
 {
-    const Events& events = m_project.previewEvents().events();
-    for (std::size_t index = 0; index < events.size(); ++index) {
-        const auto remembered = m_remembered.find(events[index]);
-        for (const Stretch& stretch : stretchesOf(m_project, events, index))
-            followStretch(memos, transaction, stretch,
-                          remembered != m_remembered.end() ? &remembered->second : nullptr);
+    const Preview preview = previewOf(memos);
+    for (const Shown& shown : preview.shown) {
+        const auto remembered = m_remembered.find(shown.event);
+        followStretch(memos, transaction, shown, preview.adrift,
+                      remembered != m_remembered.end() ? &remembered->second : nullptr);
     }
 }
 
-void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, const Stretch& stretch,
-                             const Memos* remembered)
+void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, const Shown& shown,
+                             const std::vector<HostEvent>& adrift, const Memos* remembered)
 {
-    std::vector<HostEvent> copies = memosIn(memos, stretch.preview);
+    const Stretch& stretch = shown.stretch;
+    std::vector<HostEvent> copies = shown.copies;
     std::vector<HostEvent> sources = sourcesOf(memos, stretch, copies);
     if (remembered)
         keepEdited(copies, sources, *remembered);
@@ -153,9 +190,10 @@ void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, 
     std::erase_if(copies, [&](const HostEvent& copy) {
         HostEvent memo = takeById(sources, copy.getUserId());
         if (memo)
-            carryOver(transaction, copy, memo, stretch);
+            carryOver(transaction, copy, memo, stretch, remembered ? findById(*remembered, memo.getUserId()) : nullptr);
         return static_cast<bool>(memo);
     });
+    std::erase_if(sources, [&](const HostEvent& memo) { return hasId(adrift, memo.getUserId()); });
     // What is left has no partner. As long as nothing is known of what the user has done, the numbers tell whether he has
     // removed or written something.
     if (remembered || sourceCount > copyCount) {
@@ -181,10 +219,8 @@ std::vector<HostEvent> MemoSync::sourcesOf(const Track& memos, const Stretch& st
     std::vector<HostEvent> found = memosIn(memos, stretch.source);
     // A memo that only reaches into the stretch has its copy there, too.
     for (HostEvent& memo : memos.clipEvents()) {
-        const bool reachesIn =
-            isBefore(memo.getStart(), stretch.source.end) && isBefore(stretch.source.start, memo.getEnd());
         const std::int64_t id = memo.getUserId();
-        if (reachesIn && hasId(copies, id) && !hasId(found, id))
+        if (reachesInto(memo, stretch.source) && hasId(copies, id) && !hasId(found, id))
             found.push_back(std::move(memo));
     }
     return found;
@@ -202,15 +238,20 @@ void MemoSync::keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>
     // What the user has written in the real programme meanwhile has no copy that he could have removed.
     std::erase_if(sources, [&](const HostEvent& memo) {
         const std::int64_t id = memo.getUserId();
-        return !hasId(copies, id) && std::ranges::find(remembered, id, &Memo::id) == remembered.end();
+        return !hasId(copies, id) && !findById(remembered, id);
     });
 }
 
-void MemoSync::carryOver(IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo, const Stretch& stretch)
+void MemoSync::carryOver(IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo, const Stretch& stretch,
+                         const Memo* remembered)
 {
-    const std::wstring name = copy.getName();
-    if (memo.getName() != name)
-        memo.setName(transaction, name);
+    // The memo may have been edited itself, or by another copy.
+    const Memo edited = memoOf(copy);
+    const bool isRenamed = !remembered || edited.name != remembered->name;
+    if (isRenamed && memo.getName() != edited.name)
+        memo.setName(transaction, edited.name);
+    if (remembered && edited.start == remembered->start && edited.end == remembered->end)
+        return;
 
     // What hangs over an edge of the stretch isn't in the preview, and stays.
     const auto followed = [&stretch](double own, double inPreview) {
@@ -219,8 +260,8 @@ void MemoSync::carryOver(IEditTransaction& transaction, const HostEvent& copy, H
     };
     const double ownStart = memo.getStart();
     const double ownEnd = memo.getEnd();
-    const double start = followed(ownStart, copy.getStart());
-    const double end = followed(ownEnd, copy.getEnd());
+    const double start = followed(ownStart, edited.start);
+    const double end = followed(ownEnd, edited.end);
     if (start != ownStart || (memo.isRange() && end != ownEnd)) {
         memo.setStart(transaction, start);
         if (memo.isRange())

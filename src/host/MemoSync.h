@@ -23,7 +23,9 @@ class Project;
 class Track;
 
 /// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
-/// copy have the same user id. What the user doesn't touch stays as it is, also where two events show the same memo.
+/// copy have the same user id. What the user doesn't touch stays as it is, also where two events show the same memo. A copy
+/// that is taken over an edge of its stretch is followed to the edge; one that is taken out of all stretches leaves its memo
+/// as it was.
 class MemoSync {
 public:
     explicit MemoSync(Project& project) : m_project(project) {}
@@ -55,19 +57,36 @@ private:
     };
     using Memos = std::vector<Memo>;
     using Events = std::vector<std::shared_ptr<core::EventBase>>;
+    /// A stretch with the copies that belong to it.
+    struct Shown {
+        std::shared_ptr<core::EventBase> event;
+        Stretch stretch;
+        std::vector<HostEvent> copies;
+    };
+    /// Each memo behind the preview offset belongs to the first stretch in which most of it lies or, where there is none, to
+    /// the first into which it reaches.
+    struct Preview {
+        std::vector<Shown> shown;      ///< in the order of the events
+        std::vector<HostEvent> adrift; ///< in no stretch
+    };
 
     static std::vector<Stretch> stretchesOf(const Project& project, const Events& events, std::size_t index);
+    Preview previewOf(const Track& memos) const;
     std::vector<HostEvent> memosIn(const Track& memos, const core::SecondsRange& range) const;
     static Memo memoOf(const HostEvent& event);
-    void followStretch(const Track& memos, Velmark::IEditTransaction& transaction, const Stretch& stretch,
-                       const Memos* remembered);
+    /// Null when there is none.
+    static const Memo* findById(const Memos& memos, std::int64_t id);
+    /// The memos of those adrift stay.
+    void followStretch(const Track& memos, Velmark::IEditTransaction& transaction, const Shown& shown,
+                       const std::vector<HostEvent>& adrift, const Memos* remembered);
     /// The memos that a stretch shows.
     std::vector<HostEvent> sourcesOf(const Track& memos, const Stretch& stretch,
                                      const std::vector<HostEvent>& copies) const;
     /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
     static void keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered);
+    /// What the copy was like is null where that isn't known.
     static void carryOver(Velmark::IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo,
-                          const Stretch& stretch);
+                          const Stretch& stretch, const Memo* remembered);
 
     Project& m_project;
     std::map<std::shared_ptr<core::EventBase>, Memos> m_remembered;

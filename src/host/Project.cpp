@@ -108,6 +108,13 @@ std::vector<Track> Project::cadrelTracks()
     return tracks;
 }
 
+std::vector<Track> Project::availableTracks()
+{
+    std::vector<Track> tracks = cadrelTracks();
+    std::erase_if(tracks, [](const Track& track) { return track.hostLocked() && !track.hasLockState(); });
+    return tracks;
+}
+
 void Project::setUseTrackCache(bool flag)
 {
     m_useTrackCache = flag;
@@ -225,8 +232,8 @@ void Project::onProjectChanged()
     FirstFailure failure;
     failure.ofStep([this] { updateFramerate(); });
     m_indexes.clear();
-    m_mediaPool.notifyListeners();
-    tellListeners();
+    failure.ofStep([this] { m_mediaPool.notifyListeners(); });
+    tellListeners(failure);
     failure.ofStep([this] { rememberMemos(); });
     failure.raise();
 }
@@ -237,7 +244,7 @@ void Project::onProjectEdited(IEditTransaction& transaction)
     m_indexes.clear();
     if (isPreviewing())
         failure.ofStep([&] { syncMemos(transaction); });
-    tellListeners();
+    tellListeners(failure);
     failure.raise();
 }
 
@@ -265,9 +272,9 @@ bool Project::isPreviewing() const
     return m_model.isPreviewActive() && hasPreviewOffset();
 }
 
-void Project::tellListeners()
+void Project::tellListeners(FirstFailure& failure)
 {
-    m_listeners.forEach([this](ProjectListener& listener) { listener.projectChanged(*this); });
+    m_listeners.forEach([&](ProjectListener& listener) { failure.ofStep([&] { listener.projectChanged(*this); }); });
 }
 
 Counted<IProjectNode> Project::root() const

@@ -41,6 +41,7 @@ class ProgressHandlerBase;
 
 namespace cadrel::host {
 
+class FirstFailure;
 class VideoProvider;
 
 /// One project of the host: it owns the model that belongs to it, finds and makes the tracks on which the system writes, and
@@ -73,8 +74,9 @@ public:
 
     // Storage, as attributes of the host's project; in ProjectStorage.cpp.
 
-    /// Reads the stored model into the fresh project, if there is one, and finds the tracks that were held locked. Throws
-    /// ChecksumMismatch and what the model's reading throws; the model is empty then.
+    /// Finds the tracks that are held locked and reads the stored model, if there is one, into the fresh project. When no
+    /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
+    /// model is empty then.
     void load();
     /// Replaces what is stored. A failure leaves nothing stored.
     void save();
@@ -84,11 +86,14 @@ public:
 
     // Tracks.
 
-    /// All tracks of the host, depth first: a folder comes before what it holds.
+    /// All tracks of the host, depth first: a folder comes before what it holds. Throws Result::HostObjectMissing for a
+    /// track that cannot be handled as one.
     std::vector<Velmark::Counted<Velmark::ITrackNode>> allTracks();
     std::vector<Track> tracksOfType(const char* word);
     /// All but folders and rulers: those that a run may change.
     std::vector<Track> cadrelTracks();
+    /// Those of them that the user hasn't locked: what the system itself holds locked, a run frees.
+    std::vector<Track> availableTracks();
     /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
     /// alone, in which nobody else edits.
     void setUseTrackCache(bool flag);
@@ -104,7 +109,8 @@ public:
     /// NoPreviewOffset when there is none.
     double previewOffset() const;
     void resetPreviewOffset();
-    /// Stores the first whole day past everything in the project as the offset.
+    /// Stores the first whole day past every event in the project as the offset; automation points further on don't
+    /// count.
     void computePreviewOffset();
     void getLocators(double& left, double& right) const;
     /// With `adjust` both move down by a tenth of their distance and lose the time origin; without they go to the host as
@@ -113,7 +119,8 @@ public:
 
     // The tracks of the system; in ProjectTracks.cpp.
 
-    /// Finds or makes the folder and the tracks of the markers that are switched on, and gives every memo a user id.
+    /// Finds or makes the folder and the tracks of the markers that are switched on, and gives every memo a user id
+    /// of its own.
     void createMarkerTracks(Velmark::IEditTransaction& transaction);
     /// Finds or makes the track of the new picture; does nothing without new videos.
     void createVideoTracks(Velmark::IEditTransaction& transaction);
@@ -122,6 +129,9 @@ public:
     void setTracksLocked(bool lock);
     /// The tracks that a run would change and that the user hasn't locked.
     void collectLockTracks();
+    /// Adds the tracks that the system holds locked, as a file or an undo has left them.
+    void findLockedTracks();
+    bool hasLockTracks() const { return !m_lockedTracks.empty(); }
     void releaseLockTracks() { m_lockedTracks.clear(); }
 
     // Work for the engine; in ProjectEdits.cpp.
@@ -130,20 +140,21 @@ public:
     void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
     /// The tracks are those that take part in a run, and the memos'.
     std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
-    /// Brings the preview stretch back over the real programme.
+    /// Brings the preview stretch back over the real programme. A restricted run clears the preview too, also where its
+    /// range is empty and nothing is brought back.
     void completeApply(Velmark::IEditTransaction& transaction);
     /// Writes each on the track of its kind, and none whose track isn't there. Throws Result::InvalidArgument for an entry
     /// whose kind is none of MarkerKind; earlier ones stay written.
     void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
-    /// Lets the automation run straight where two cuts that follow on one another don't meet. The cuts are those that
-    /// makeCut made.
+    /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what
+    /// another cut has written there. The cuts are those that makeCut made.
     void markVirginTerritories(Velmark::IEditTransaction& transaction, const core::CutList& cuts);
     /// Unlocks the tracks and empties the preview stretch.
     void clearPreview(Velmark::IEditTransaction& transaction);
     /// What a run replaces.
     void getApplyRange(double& start, double& end) const;
     /// Lets the host join the pieces that the cuts have left of one clip.
-    void closeRange(Velmark::IEditTransaction& transaction, bool onlySelected, double start, double end);
+    void closeRange(bool onlySelected, double start, double end);
     /// Makes room for the preview; does nothing unless preview is on. With `active` only tracks that have changed count.
     void extendProjectEnd(bool active);
     core::CadrelRunState runState();
@@ -154,15 +165,16 @@ public:
 
     // What the host tells.
 
-    /// Tells all listeners, whatever becomes of the rate. Throws what getFramerate throws.
+    /// Carries out all, and throws the first failure at the end: reads the rate anew, and tells all listeners.
     void onProjectChanged();
-    /// Lets the memos follow their copies in the preview.
+    /// The same: lets the memos follow their copies in the preview, and tells all listeners.
     void onProjectEdited(Velmark::IEditTransaction& transaction);
     /// Not owned.
     void addListener(ProjectListener* listener) { m_listeners.add(listener); }
     void removeListener(ProjectListener* listener) { m_listeners.remove(listener); }
 
 private:
+    void readModel();
     core::Framerate readFramerate() const;
     void updateFramerate();
     /// The seconds of a day of the clock under the project's rate.
@@ -175,7 +187,7 @@ private:
     double latestEnd(const std::vector<Track>& tracks, double before, double earliest) const;
     Velmark::Counted<Velmark::IProjectNode> root() const;
     Velmark::IParameter& locator(const char* name) const;
-    void tellListeners();
+    void tellListeners(FirstFailure& failure);
     bool isPreviewing() const;
     void syncMemos(Velmark::IEditTransaction& transaction);
     void rememberMemos();

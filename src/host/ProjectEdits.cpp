@@ -47,6 +47,11 @@ bool precedes(const SecondsRange& a, const SecondsRange& b)
 /// Cuts that stand no further apart meet, in seconds.
 constexpr double ShortestGap = 0.01;
 
+bool isLongEnough(const SecondsRange& gap)
+{
+    return isBefore(ShortestGap, gap.end - gap.start);
+}
+
 const CutEvent& hostEvent(const std::shared_ptr<core::CutEventBase>& cutEvent)
 {
     return dynamic_cast<const CutEvent&>(*cutEvent);
@@ -65,6 +70,36 @@ std::vector<SourceGroup> groupsOf(const core::Cut& cut)
         place->tracks.push_back(&hostEvent(cutEvent).track());
     }
     return groups;
+}
+
+/// The automation of a track in which the cuts have left gaps.
+struct GapTrack {
+    std::vector<AutomationCurve> curves;
+    /// What the cuts have written, and the gaps that are filled. In seconds, without the offset.
+    std::vector<SecondsRange> done;
+};
+
+/// Adds a stretch to ranges that ascend and stand apart, and answers the pieces of it that none of them covered.
+std::vector<SecondsRange> cover(std::vector<SecondsRange>& ranges, const SecondsRange& stretch)
+{
+    const auto first = std::ranges::partition_point(
+        ranges, [&stretch](const SecondsRange& range) { return isBefore(range.end, stretch.start); });
+    SecondsRange whole = stretch;
+    if (first != ranges.end())
+        whole.start = std::min(whole.start, first->start);
+    std::vector<SecondsRange> pieces;
+    double covered = stretch.start;
+    auto behind = first;
+    for (; behind != ranges.end() && !isBefore(stretch.end, behind->start); ++behind) {
+        if (isBefore(covered, behind->start))
+            pieces.push_back({covered, behind->start});
+        covered = std::max(covered, behind->end);
+    }
+    if (isBefore(covered, stretch.end))
+        pieces.push_back({covered, stretch.end});
+    whole.end = std::max(whole.end, covered);
+    ranges.insert(ranges.erase(first, behind), whole);
+    return pieces;
 }
 
 std::vector<const Track*> pointersTo(const std::vector<Track>& tracks)
@@ -181,17 +216,26 @@ void Project::generateMarkers(IEditTransaction& transaction, const std::vector<c
 //     cuts       |---- i - 1 ----|        |---- i ----|
 //     curve    --+--.      .-----+--------+---.   .---+--
 //                    `----'                    `-'
+//
+// Cuts are in the order of the change list, so that another one may lie between them.
 void Project::markVirginTerritories(IEditTransaction& transaction, const core::CutList& cuts)
 {
     const double offset = requiredOffset();
     m_indexes.clear();
-    std::map<const ITrackNode*, std::vector<AutomationCurve>> curves;
+    std::map<const ITrackNode*, GapTrack> tracks;
     for (const Track& track : cadrelTracks()) {
         if (isWanted(track) && !track.hostLocked())
-            curves.emplace(track.node(), track.prepareVirginRange());
+            tracks.emplace(track.node(), GapTrack{track.prepareVirginRange(), {}});
+    }
+    for (std::size_t i = 0; i < cuts.size(); ++i) {
+        for (const auto& cutEvent : cuts.cutAt(i)->cutEvents()) {
+            const auto ofTrack = tracks.find(hostEvent(cutEvent).track().node());
+            if (ofTrack != tracks.end() && isBefore(cutEvent->dstIn(), cutEvent->dstOut()))
+                cover(ofTrack->second.done, {cutEvent->dstIn(), cutEvent->dstOut()});
+        }
     }
     for (std::size_t i = 1; i < cuts.size(); ++i) {
-        tick(curves.size());
+        tick(tracks.size());
         const core::Cut& before = *cuts.cutAt(i - 1);
         const core::Cut& behind = *cuts.cutAt(i);
         if (behind.event()->dstIn() == before.event()->dstOut())
@@ -201,9 +245,15 @@ void Project::markVirginTerritories(IEditTransaction& transaction, const core::C
         for (std::size_t index = 0; index < count; ++index) {
             const CutEvent& a = hostEvent(before.cutEvents()[index]);
             const CutEvent& b = hostEvent(behind.cutEvents()[index]);
-            const auto ofTrack = curves.find(a.track().node());
-            if (b.track() == a.track() && ofTrack != curves.end() && isBefore(ShortestGap, b.dstIn() - a.dstOut()))
-                a.track().fillAutomationGap(transaction, ofTrack->second, a.dstOut() + offset, b.dstIn() + offset);
+            const auto ofTrack = tracks.find(a.track().node());
+            const SecondsRange gap{a.dstOut(), b.dstIn()};
+            if (!(b.track() == a.track()) || ofTrack == tracks.end() || !isLongEnough(gap))
+                continue;
+            auto& [curves, done] = ofTrack->second;
+            for (const SecondsRange& piece : cover(done, gap)) {
+                if (isLongEnough(piece))
+                    a.track().fillAutomationGap(transaction, curves, piece.start + offset, piece.end + offset);
+            }
         }
     }
 }
@@ -233,11 +283,12 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
         track.removeRange(transaction, start, end);
         tick(1);
     }
-    copyRange(pointersTo(tracks), start + offset, end + offset, start);
-    // Nothing was written before the stretch, and an edge there would leave points behind.
+    // What stands before the stretch is the real programme's own, and an edge there would leave points behind.
     const double written = std::max(start, 0.0);
-    if (isBefore(written, end))
-        deleteRange(transaction, written + offset, end + offset);
+    if (!isBefore(written, end))
+        return;
+    copyRange(pointersTo(tracks), written + offset, end + offset, written);
+    deleteRange(transaction, written + offset, end + offset);
 }
 
 void Project::clearPreview(IEditTransaction& transaction)
@@ -256,7 +307,7 @@ void Project::getApplyRange(double& start, double& end) const
     end = settings.restrictRange() ? settings.preserveMaterialAfter() : offset;
 }
 
-void Project::closeRange(IEditTransaction& /*transaction*/, bool onlySelected, double start, double end)
+void Project::closeRange(bool onlySelected, double start, double end)
 {
     m_indexes.clear();
     std::vector<Track> tracks = cadrelTracks();

@@ -1,4 +1,5 @@
 #include "core/serialize/ByteArchive.h"
+#include "host/FirstFailure.h"
 #include "host/FramerateScope.h"
 #include "host/HostFailure.h"
 #include "host/Project.h"
@@ -51,6 +52,20 @@ std::uint32_t readChecksum(IProjectNode& project)
 
 void Project::load()
 {
+    findLockedTracks();
+    FirstFailure failure;
+    failure.ofStep([this] { readModel(); });
+    if (!m_model.isPreviewActive()) {
+        // There is nothing left that the user could switch off. What can't be unlocked here, the next run unlocks.
+        for (Track& track : m_lockedTracks)
+            resultOf([&] { track.setLock(false); });
+        std::erase_if(m_lockedTracks, [](const Track& track) { return !track.hasLockState(); });
+    }
+    failure.raise();
+}
+
+void Project::readModel()
+{
     const auto project = root();
     if (project->hasAttribute(AttributeKey::Storage) != ResultOk)
         return;
@@ -61,10 +76,6 @@ void Project::load()
     // The timecodes in the block are those of this project.
     const FramerateScope ownRate(*this);
     block >> m_model;
-    for (const Track& track : cadrelTracks()) {
-        if (track.hasLockState())
-            m_lockedTracks.push_back(track);
-    }
 }
 
 void Project::save()

@@ -31,9 +31,9 @@ void Project::createMarkerTracks(IEditTransaction& transaction)
         if (isMarkerRoleOn(role))
             findOrCreateMarkerTrack(transaction, role);
     }
-    // By these the copies in a preview are known again.
+    // By these the copies in a preview are known again. What is copied keeps its id, so several memos may have the same.
     if (hasPreviewOffset())
-        markerTrack(TrackRole::Memos).assignIds(0.0, previewOffset() - timeOrigin());
+        markerTrack(TrackRole::Memos).assignOwnIds(0.0, previewOffset() - timeOrigin());
 }
 
 void Project::createVideoTracks(IEditTransaction& transaction)
@@ -46,22 +46,26 @@ void Project::createVideoTracks(IEditTransaction& transaction)
 
 void Project::setTracksLocked(bool lock)
 {
-    FirstFailure failure;
-    const auto setLock = [&](Track& track) {
+    const auto setLock = [lock](Track& track) {
         if (track.isAlive())
-            failure.ofStep([&] { track.setLock(lock); });
+            track.setLock(lock);
     };
+    FirstFailure failure;
     for (Track& track : m_lockedTracks)
-        setLock(track);
+        failure.ofStep([&] { setLock(track); });
     for (std::int32_t role = TrackRole::Destination; role <= TrackRole::LastMarker; ++role) {
-        findTrack(markerTrack(role), TypeWord::Marker, role);
-        // The user goes on to write memos in a preview.
-        if (role != TrackRole::Memos)
-            setLock(markerTrack(role));
+        failure.ofStep([&] {
+            findTrack(markerTrack(role), TypeWord::Marker, role);
+            // The user goes on to write memos in a preview.
+            if (role != TrackRole::Memos)
+                setLock(markerTrack(role));
+        });
     }
-    Track video = newVideoTrack();
-    findTrack(video, TypeWord::Video, TrackRole::NewVideo);
-    setLock(video);
+    failure.ofStep([&] {
+        Track video = newVideoTrack();
+        findTrack(video, TypeWord::Video, TrackRole::NewVideo);
+        setLock(video);
+    });
     failure.raise();
 }
 
@@ -72,6 +76,14 @@ void Project::collectLockTracks()
     for (const Track& track : cadrelTracks()) {
         const bool isOwn = isMarkerTrack(track) || track == video;
         if (!isOwn && isWanted(track) && !track.hostLocked())
+            m_lockedTracks.push_back(track);
+    }
+}
+
+void Project::findLockedTracks()
+{
+    for (const Track& track : cadrelTracks()) {
+        if (track.hasLockState() && std::ranges::find(m_lockedTracks, track) == m_lockedTracks.end())
             m_lockedTracks.push_back(track);
     }
 }

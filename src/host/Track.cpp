@@ -17,6 +17,7 @@
 #include <iterator>
 #include <limits>
 #include <map>
+#include <set>
 #include <utility>
 
 using namespace Velmark;
@@ -293,6 +294,19 @@ void Track::assignIds(double start, double end)
     std::int64_t last = highestUserId();
     for (HostEvent& event : eventsInRange(start, end)) {
         if (event.getUserId() == -1)
+            event.setUserId(last = idAfter(last));
+    }
+}
+
+void Track::assignOwnIds(double start, double end)
+{
+    std::vector<HostEvent> events = eventsInRange(start, end);
+    std::erase_if(events,
+                  [until = end + timeOrigin()](const HostEvent& event) { return !isBefore(event.getStart(), until); });
+    std::int64_t last = highestUserId();
+    std::set<std::int64_t> taken{-1, 0};
+    for (HostEvent& event : events) {
+        if (!taken.insert(event.getUserId()).second)
             event.setUserId(last = idAfter(last));
     }
 }

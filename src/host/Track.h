@@ -86,6 +86,9 @@ public:
 
     /// Gives a user id to every event in the range that has none.
     void assignIds(double start, double end);
+    /// Gives a new one also to those whose id is 0 or stands on an earlier event of the range. An event that starts at the
+    /// end isn't in the range.
+    void assignOwnIds(double start, double end);
     /// One more than the highest of the track.
     std::int64_t nextUserId() const;
 

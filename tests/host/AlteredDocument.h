@@ -14,6 +14,7 @@ public:
     explicit AlteredDocument(Velmark::IProjectDocument* document) : m_document(document) {}
 
     bool hasLocators = true;
+    Velmark::ILocators* locators = nullptr; ///< instead of the project's
     bool makesTracks = true;
     bool hasContainers = true;
     Velmark::IMarkerTrack* defaultMarkerTrack = nullptr;
@@ -34,7 +35,12 @@ public:
         return m_document->getProjectFile(project);
     }
     Velmark::IMarkerTrack* getDefaultMarkerTrack() override { return defaultMarkerTrack; }
-    Velmark::ILocators* getLocators() override { return hasLocators ? m_document->getLocators() : nullptr; }
+    Velmark::ILocators* getLocators() override
+    {
+        if (!hasLocators)
+            return nullptr;
+        return locators ? locators : m_document->getLocators();
+    }
     Velmark::FUnknown* getContainer(Velmark::FUnknown* object) override
     {
         return hasContainers ? m_document->getContainer(object) : nullptr;

@@ -56,10 +56,12 @@ public:
     Velmark::Counted<Velmark::IObjectList> automation;
     /// Whether it answers for IProjectNode.
     bool isNode = true;
+    /// Whether it answers for ITrackNode.
+    bool isTrack = true;
 
     Velmark::int32 queryInterface(const Velmark::Identifier& id, void** out) override
     {
-        if (!isNode && id == Velmark::IProjectNode::iid) {
+        if ((!isNode && id == Velmark::IProjectNode::iid) || (!isTrack && id == Velmark::ITrackNode::iid)) {
             *out = nullptr;
             return Velmark::ResultNoInterface;
         }
@@ -100,6 +102,18 @@ public:
     static constexpr const char* ClassName = "FakeProject";
 
     explicit FakeProject(double origin) : m_origin(origin) {}
+
+    /// One with a track that isn't to be had as one.
+    static Velmark::Counted<FakeProject> withoutUsableTrack()
+    {
+        auto project = Velmark::makeCounted<FakeProject>(0.0);
+        auto track = Velmark::makeCounted<FakeNode>();
+        track->words = {Velmark::TypeWord::Track};
+        track->isTrack = false;
+        project->children.push_back(std::move(track));
+        project->isTrack = false;
+        return project;
+    }
 
     /// Whether objects have a container: themselves.
     bool hasContainers = true;

@@ -3,8 +3,11 @@
 #include "host/Host.h"
 #include "host/TrackRole.h"
 #include "standin/project/Track.h"
+#include "standin/services/IdleManager.h"
+#include "tests/core/ThrownResult.h"
 #include "tests/host/AdaptedHost.h"
 #include "tests/host/FailingHost.h"
+#include "tests/host/WatchedProgress.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>
@@ -12,12 +15,14 @@
 #include <algorithm>
 #include <cstddef>
 #include <functional>
+#include <initializer_list>
 #include <string>
 
 namespace cadrel::host::tests {
 namespace {
 
 using namespace Velmark;
+using cadrel::tests::thrownBy;
 using util::Result;
 
 using Entries = AdaptedHost::Entries;
@@ -92,8 +97,21 @@ public:
         return std::ranges::any_of(tracks, [](const standin::Track* track) { return track->isLocked(); });
     }
 
+    bool isIdleBlocked() { return host.application.idleManager().isBlocked(); }
+    /// How many of the locators, the cycle and the position the model keeps for the end of a preview.
+    std::size_t keptCount()
+    {
+        using Key = core::PropertyKey;
+        const auto keeps = [this](std::initializer_list<std::int32_t> keys) {
+            return std::ranges::all_of(keys, [this](std::int32_t key) { return host.model().hasProperty(key); });
+        };
+        return std::size_t{keeps({Key::ProjectCycleLeft, Key::ProjectCycleRight})} +
+               std::size_t{keeps({Key::TransportCycleLower, Key::TransportCycleUpper})} +
+               std::size_t{keeps({Key::TransportPosition})};
+    }
+
     AdaptedHost host;
-    FailingHost failing{host.context()};
+    FailingHost failing{&host.altered};
     Entries entriesBefore;
 };
 
@@ -107,18 +125,25 @@ TEST_P(HostFailingTest, ARunCanBeTakenBackAndTellsOfItsFailureWhicheverCallFails
 {
     std::string whole;
     std::size_t incomplete = 0;
+    std::size_t leftBlocked = 0;
     // The first time round none fails.
     for (std::size_t call = 0;; ++call) {
         SCOPED_TRACE(call);
         FailingFilm film(GetParam());
-        ASSERT_EQ(film.host.adapter().startCadrel(), Result::Ok);
-        const std::string before = film.host.bytes();
+        Result::Type started = Result::NotAvailable;
+        std::string before;
 
-        const bool hasFailed = film.failIn(call, [&] { film.host.idle(); });
+        const bool hasFailed = film.failIn(call, [&] {
+            ASSERT_NO_THROW(started = film.host.adapter().startCadrel());
+            before = film.host.bytes();
+            film.host.idle();
+        });
 
         ASSERT_FALSE(film.host.isEditOpen());
+        leftBlocked += std::size_t{film.isIdleBlocked()};
         const std::string after = film.host.bytes();
         const std::u16string entry = film.newEntry();
+        EXPECT_TRUE(started == Result::Ok || entry.empty()) << "It wasn't requested.";
         if (call == 0)
             whole = after;
         if (entry == u"Apply Cadrel") {
@@ -133,24 +158,80 @@ TEST_P(HostFailingTest, ARunCanBeTakenBackAndTellsOfItsFailureWhicheverCallFails
             break;
     }
     EXPECT_GT(incomplete, 100U);
+    EXPECT_LE(leftBlocked, 1U) << "Only where the host refuses to end the block.";
+}
+
+TEST_P(HostFailingTest, ARunThatIsCancelledCanBeTakenBackAndTellsOfItsFailureWhicheverCallFails)
+{
+    std::string whole;
+    std::size_t takenBack = 0;
+    std::size_t incomplete = 0;
+    std::size_t kept = 0;
+    for (std::size_t call = 0;; ++call) {
+        SCOPED_TRACE(call);
+        FailingFilm film(GetParam());
+        const auto progress = makeCounted<WatchedProgress>();
+        film.host.altered.replace(IProgressService::iid, progress);
+        // The first time round nobody cancels, and the second none fails.
+        progress->whenCalled = [&] {
+            if (call > 0 && progress->calls.back().find("Event: 2") != std::string::npos)
+                progress->cancel();
+        };
+        ASSERT_EQ(film.host.adapter().startCadrel(), Result::Ok);
+        const std::string before = film.host.bytes();
+
+        const bool hasFailed = film.failIn(call > 0 ? call - 1 : 0, [&] { film.host.idle(); });
+
+        ASSERT_FALSE(film.host.isEditOpen());
+        const std::string after = film.host.bytes();
+        const std::u16string entry = film.newEntry();
+        if (call == 0)
+            whole = after;
+        if (entry.empty()) {
+            ++takenBack;
+        } else if (entry == u"Apply Cadrel") {
+            // The cancel went unheard, or its undo was refused.
+            kept += std::size_t{after != whole};
+        } else {
+            EXPECT_EQ(entry, u"Apply Cadrel (incomplete)");
+            ++incomplete;
+        }
+        ASSERT_TRUE(entry.empty() || film.host.undo());
+        ASSERT_EQ(film.host.bytes(), before);
+        if (!hasFailed && call > 1)
+            break;
+    }
+    EXPECT_GT(takenBack, 1U);
+    EXPECT_GT(incomplete, 50U);
+    EXPECT_LE(kept, 1U) << "It looks done and isn't.";
 }
 
 TEST_P(HostFailingTest, APreviewCanBeTakenBackAndTellsOfItsFailureWhicheverCallFails)
 {
     std::string whole;
     std::size_t incomplete = 0;
+    std::size_t leftBlocked = 0;
     for (std::size_t call = 0;; ++call) {
         SCOPED_TRACE(call);
         FailingFilm film(GetParam());
         AdaptedHost& host = film.host;
-        host.adapter().setPreviewActive(true);
-        ASSERT_EQ(host.adapter().startPreview(host.model().changeEdl(), 0, 0, 1), Result::Ok);
-        const std::string before = film.content();
+        Result::Type switched = Result::NotAvailable;
+        Result::Type started = Result::NotAvailable;
+        std::string before;
 
-        const bool hasFailed = film.failIn(call, [&] { host.idle(); });
+        const bool hasFailed = film.failIn(call, [&] {
+            switched = thrownBy([&] { host.adapter().setPreviewActive(true); });
+            EXPECT_TRUE(host.adapter().isPreviewActive());
+            EXPECT_GE(film.keptCount(), switched == Result::Ok ? 3U : 2U) << "Each is kept for itself.";
+            ASSERT_NO_THROW(started = host.adapter().startPreview(host.model().changeEdl(), 0, 0, 1));
+            before = film.content();
+            host.idle();
+        });
 
         ASSERT_FALSE(host.isEditOpen());
+        leftBlocked += std::size_t{film.isIdleBlocked()};
         const std::u16string entry = film.newEntry();
+        EXPECT_TRUE(started == Result::Ok || entry.empty()) << "It wasn't requested.";
         if (!entry.empty()) {
             ASSERT_TRUE(host.undo());
             // Whoever isn't in a preview any more holds no track.
@@ -163,7 +244,8 @@ TEST_P(HostFailingTest, APreviewCanBeTakenBackAndTellsOfItsFailureWhicheverCallF
         if (call == 0)
             whole = after;
         if (entry == u"Preview") {
-            EXPECT_TRUE(after == whole || film.failing.failedToTell()) << "It looks done and isn't.";
+            EXPECT_TRUE(after == whole || film.failing.failedToTell() || switched != Result::Ok)
+                << "It looks done and isn't.";
         } else if (!entry.empty()) {
             EXPECT_EQ(entry, u"Preview (incomplete)");
             ++incomplete;
@@ -172,29 +254,32 @@ TEST_P(HostFailingTest, APreviewCanBeTakenBackAndTellsOfItsFailureWhicheverCallF
             break;
     }
     EXPECT_GT(incomplete, 100U);
+    EXPECT_LE(leftBlocked, 1U) << "Only where the host refuses to end the block.";
 }
 
 TEST_P(HostFailingTest, APreviewIsOffAtItsEndWhicheverCallFails)
 {
-    for (std::size_t call = 1;; ++call) {
+    std::string contentBefore;
+    // The first time round it isn't ended.
+    for (std::size_t call = 0;; ++call) {
         SCOPED_TRACE(call);
         FailingFilm film(GetParam());
         AdaptedHost& host = film.host;
         host.adapter().setPreviewActive(true);
         host.preview(host.model().changeEdl());
-        const std::string contentBefore = film.content();
+        ASSERT_TRUE(film.isAnyTrackLocked());
+        if (call == 0) {
+            contentBefore = film.content();
+            continue;
+        }
         film.entriesBefore = host.undoNames();
 
-        const bool hasFailed = film.failIn(call, [&] {
-            try {
-                host.adapter().setPreviewActive(false);
-            } catch (Result::Type) {
-                // It says so, when all that could be done has been.
-            }
-        });
+        // It says so, when all that could be done has been.
+        const bool hasFailed = film.failIn(call, [&] { thrownBy([&] { host.adapter().setPreviewActive(false); }); });
 
         ASSERT_FALSE(host.isEditOpen());
         EXPECT_FALSE(host.adapter().isPreviewActive());
+        EXPECT_FALSE(film.isAnyTrackLocked());
         const std::u16string entry = film.newEntry();
         if (!entry.empty()) {
             EXPECT_TRUE(entry == u"End Preview" || entry == u"End Preview (incomplete)");

@@ -2,6 +2,7 @@
 
 #include "core/CadrelerBase.h"
 #include "core/DataModelCommandCreator.h"
+#include "core/MediaPoolInterface.h"
 #include "core/Timecode.h"
 #include "gui/AlertWindowBase.h"
 #include "gui/FileBrowserDialogBase.h"
@@ -79,6 +80,24 @@ public:
     int pictures = 0;
 
     void imageChanged(std::size_t) override { ++pictures; }
+};
+
+/// A list of binary values that takes no more.
+class FullList : public Implements<FullList, FObject, IAttributeData> {
+public:
+    static constexpr const char* ClassName = "FullList";
+
+    int32 setBinary(const char*, const void*, int32, bool) override { return ResultFalse; }
+    int32 getBinary(const char*, void*, int32) override { return ResultFalse; }
+    int32 getBinarySize(const char*) override { return 0; }
+};
+
+/// Looks at the frames of a second whenever the media change.
+class RateListener : public core::MediaPoolInterface::Listener {
+public:
+    std::vector<std::int32_t> rates;
+
+    void mediaPoolChanged() override { rates.push_back(Timecode::framerate().framesPerSecond); }
 };
 
 /// A manager of projects of which some indexes are empty.
@@ -294,8 +313,8 @@ TEST_F(HostNotificationsTest, DropsTheEndOfAProjectThatItDoesNotKnow)
     const auto stranger = makeCounted<standin::Project>(host.application.edits().log());
     heard.forget();
 
-    EXPECT_EQ(host.adapter().projectClosing(stranger.get(), 0), Result::HostObjectMissing);
-    EXPECT_EQ(host.adapter().projectClosing(nullptr, 0), Result::HostObjectMissing);
+    EXPECT_EQ(host.adapter().projectClosing(stranger.get(), 0), ResultOk);
+    EXPECT_EQ(host.adapter().projectClosing(nullptr, 0), ResultOk);
 
     EXPECT_TRUE(heard.types.empty());
     EXPECT_TRUE(host.alerts->messages.empty());
@@ -328,6 +347,47 @@ TEST_F(HostNotificationsTest, SaysThatASaveWentWrong)
     EXPECT_NE(host.adapter().projectStoring(host.document()), ResultOk);
 
     EXPECT_EQ(host.alerts->messages, Messages{u"An error occurred while saving the Cadrel data."});
+}
+
+TEST_F(HostNotificationsTest, LeavesNothingStoredWhereTheHostTakesNoBlock)
+{
+    host.project.announceStoring();
+    ASSERT_EQ(host.project.hasAttribute(AttributeKey::Storage), ResultOk);
+    ASSERT_EQ(host.project.hasAttribute(AttributeKey::StorageChecksum), ResultOk);
+    host.altered.replace(IAttributeData::iid, makeCounted<FullList>());
+
+    EXPECT_EQ(host.adapter().projectStoring(host.document()), Result::HostCallFailed);
+
+    EXPECT_NE(host.project.hasAttribute(AttributeKey::Storage), ResultOk);
+    EXPECT_NE(host.project.hasAttribute(AttributeKey::StorageChecksum), ResultOk);
+    EXPECT_EQ(host.alerts->messages, Messages{u"An error occurred while saving the Cadrel data."});
+}
+
+TEST_F(HostNotificationsTest, StoresAProjectAtItsOwnRateWhileAnotherIsActive)
+{
+    // Frame 28 is one of 30 a second, and none of 25.
+    standin::Project& second = host.application.createProject();
+    second.setFrameRate({30.0, 0});
+    host.application.activateProject(&second);
+    host.carryOver("01:00:00:28", "01:00:10:28", "01:00:05:28", "01:00:15:28");
+    const ByteArchive expected = DataModelEditStep::snapshotOf(host.model());
+    host.application.activateProject(&host.project);
+
+    second.announceStoring();
+    EXPECT_NE(host.project.hasAttribute(AttributeKey::Storage), ResultOk) << "The active project isn't saved.";
+    EXPECT_EQ(Timecode::framerate().framesPerSecond, 25);
+    host.adapter().projectClosing(&second, 0);
+    host.adapter().projectOpened(&second);
+    EXPECT_EQ(Timecode::framerate().framesPerSecond, 25);
+    host.application.activateProject(&second);
+    host.adapter().projectActivated(&second);
+
+    ASSERT_EQ(host.model().changeEdl().size(), 1U);
+    EXPECT_TRUE(host.model().changeEdl().at(0).isValid());
+    const ByteArchive found = DataModelEditStep::snapshotOf(host.model());
+    EXPECT_EQ(std::vector(found.data(), found.data() + found.size()),
+              std::vector(expected.data(), expected.data() + expected.size()));
+    EXPECT_TRUE(host.alerts->messages.empty());
 }
 
 TEST_F(HostNotificationsTest, SaysThatAProjectThatItDoesNotKnowWasNotSaved)
@@ -372,6 +432,22 @@ TEST_F(HostNotificationsTest, SaysThatBrokenDataAreIgnored)
 
     EXPECT_EQ(host.alerts->messages,
               Messages{u"An error occurred while loading the Cadrel data. The data will be ignored."});
+}
+
+TEST_F(HostNotificationsTest, SaysThatDataAreIgnoredWhichTheHostDoesNotGive)
+{
+    host.project.setAttribute(AttributeKey::Storage, FVariant::integer(1), true);
+    host.project.setAttribute(AttributeKey::StorageChecksum, FVariant::integer(0), true);
+    reopen(host.project);
+
+    const auto empty = create<IAttributeData>(host.context());
+    host.project.setAttribute(AttributeKey::Storage, FVariant::object(empty.get()), true);
+    reopen(host.project);
+
+    EXPECT_EQ(host.alerts->messages,
+              (Messages{u"An error occurred while loading the Cadrel data. The data will be ignored.",
+                        u"An error occurred while loading the Cadrel data. The data will be ignored."}));
+    EXPECT_TRUE(host.model().changeEdl().isEmpty());
 }
 
 TEST_F(HostNotificationsTest, WorksOnWithAnEmptyModelWhenNothingCouldBeLoaded)
@@ -443,6 +519,23 @@ TEST_F(HostNotificationsTest, LooksAtAnotherProjectAtThatOnesRate)
     EXPECT_EQ(Timecode::framerate().framesPerSecond, 30) << "The active project's rate counts again.";
 }
 
+TEST_F(HostNotificationsTest, LetsTheListenersOfAnotherProjectCountAtThatOnesRate)
+{
+    standin::Project& second = host.application.createProject();
+    second.setFrameRate({30.0, 0});
+    host.application.activateProject(&second);
+    core::MediaPoolInterface& media = *host.adapter().getMediaPool();
+    RateListener listener;
+    media.addListener(&listener);
+    host.application.activateProject(&host.project);
+
+    host.adapter().update(static_cast<IProjectDocument*>(&second), 0);
+
+    EXPECT_EQ(listener.rates, std::vector<std::int32_t>{30});
+    EXPECT_EQ(Timecode::framerate().framesPerSecond, 25);
+    media.removeListener(&listener);
+}
+
 TEST_F(HostNotificationsTest, TakesNoNoticeOfTheChangesOfOthers)
 {
     heard.forget();
@@ -462,16 +555,6 @@ TEST_F(HostNotificationsTest, AnswersOnlyForEditsOfTheActiveProject)
 
     host.application.activateProject(nullptr);
     EXPECT_EQ(host.adapter().projectEdited(host.document(), nullptr), ResultOk);
-}
-
-TEST_F(HostNotificationsTest, TellsNoFailureOfAnEditButTheOne)
-{
-    // A rate that is none fails in another way than a transaction that isn't there.
-    host.model().setPreviewActive(true);
-    host.project.setFrameRate({1e9, 0});
-    host.adapter().update(host.document(), 0);
-
-    EXPECT_EQ(host.adapter().projectEdited(host.document(), nullptr), Result::HostObjectMissing);
 }
 
 TEST_F(HostNotificationsTest, LetsNoExceptionReachTheHost)

@@ -10,6 +10,7 @@
 #include "host/VideoProvider.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AdaptedHost.h"
+#include "tests/host/FakeProject.h"
 #include "velmark/Attributes.h"
 #include "velmark/Tracks.h"
 
@@ -204,6 +205,41 @@ TEST_P(HostOperationsTest, StartsNothingThatCannotBeDone)
     EXPECT_EQ(adapter().canStart(), Result::NoProject);
 }
 
+TEST_P(HostOperationsTest, StartsNothingOnTracksThatTheUserHasLocked)
+{
+    const auto locked = host.addTrack(TypeWord::Audio, u"DX");
+    const auto isLocked = [&](bool lock) { query<ITrackNode>(locked)->setFlag(TrackFlag::Lock, lock); };
+    carryOverTwo();
+    isLocked(true);
+    EXPECT_EQ(adapter().canStart(), Result::NoTracks);
+
+    host.addTrack(TypeWord::Audio, u"FX");
+    EXPECT_EQ(adapter().canStart(), Result::Ok);
+    dynamic_cast<standin::Node&>(*locked).setSelected(true);
+    host.settings().setApplyTo(ApplyTo::SelectedTracks);
+    EXPECT_EQ(adapter().canStart(), Result::NoTracksSelected);
+    EXPECT_EQ(adapter().startCadrel(), Result::NoTracksSelected);
+
+    isLocked(false);
+    EXPECT_EQ(adapter().canStart(), Result::Ok);
+    // What the system holds itself, it frees for a run.
+    isLocked(true);
+    locked->setAttribute(AttributeKey::LockState, FVariant::integer(1), true);
+    EXPECT_EQ(adapter().canStart(), Result::Ok);
+}
+
+TEST_P(HostOperationsTest, AnswersWhyAProjectCannotBeRunThatHasNoUsableTracks)
+{
+    const auto broken = FakeProject::withoutUsableTrack();
+    adapter().projectOpened(broken.get());
+    adapter().projectActivated(broken.get());
+    carryOverTwo();
+
+    EXPECT_EQ(adapter().canStart(), Result::HostObjectMissing);
+
+    adapter().projectClosing(broken.get(), 0);
+}
+
 TEST_P(HostOperationsTest, AnswersWhyARequestIsRefused)
 {
     EXPECT_EQ(adapter().startCadrel(), Result::ChangeEdlEmpty);
@@ -369,6 +405,11 @@ TEST_P(HostOperationsTest, EstimatesAStepForEachEventOnEachTrack)
 
     settings.setCreateVirginTerritories(true);
     EXPECT_EQ(adapter().estimateSteps(5, settings, 77), 2U * 5U * 3U);
+
+    const auto locked = host.addTrack(TypeWord::Audio, u"Locked");
+    dynamic_cast<standin::Node&>(*locked).setSelected(true);
+    query<ITrackNode>(locked)->setFlag(TrackFlag::Lock, true);
+    EXPECT_EQ(adapter().estimateSteps(5, settings, 77), 2U * 5U * 3U) << "Nothing is done there.";
 
     settings.setApplyTo(ApplyTo::SelectedTracks);
     EXPECT_EQ(adapter().estimateSteps(5, settings, 77), 2U * 5U);

@@ -2,11 +2,14 @@
 
 #include "core/ChangeContext.h"
 #include "host/Host.h"
+#include "host/PreviewEventsStep.h"
 #include "host/Project.h"
 #include "host/TrackRole.h"
 #include "tests/core/RecordingListener.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AdaptedHost.h"
+#include "tests/host/AlteredEdits.h"
+#include "tests/host/HostedModel.h"
 #include "tests/host/WatchedProgress.h"
 #include "velmark/Attributes.h"
 #include "velmark/Tracks.h"
@@ -16,6 +19,7 @@
 #include <algorithm>
 #include <functional>
 #include <initializer_list>
+#include <memory>
 #include <string>
 #include <utility>
 #include <vector>
@@ -213,6 +217,22 @@ TEST_P(HostPreviewTest, IsTakenBackWholeByAnUndo)
     EXPECT_EQ(host.contentOf(track), after);
 }
 
+TEST_P(HostPreviewTest, LeadsTheUserBackWhenItIsUndone)
+{
+    for (const bool atDestination : {true, false}) {
+        SCOPED_TRACE(atDestination);
+        adapter().setPreviewActive(true);
+        host.preview(changes(), 0, 0, atDestination);
+        ASSERT_NE(transportCycle(), Span(4.0, 9.0));
+
+        ASSERT_TRUE(host.undo());
+
+        EXPECT_EQ(transportCycle(), Span(4.0, 9.0));
+        EXPECT_EQ(host.project.position().getValue(), 5.0);
+        EXPECT_EQ(locators(), Span(3.0, 8.0));
+    }
+}
+
 TEST_P(HostPreviewTest, LeavesThePreviewOnWhenALaterOneIsUndone)
 {
     previewAll();
@@ -249,6 +269,28 @@ TEST_P(HostPreviewTest, ShowsItsProgressWithoutAWayToCancel)
     EXPECT_EQ(std::ranges::count(progress->calls, "setRange 2"), 1);
     EXPECT_EQ(std::ranges::count(progress->calls, "Project Preview - Generate Markers"), 1);
     EXPECT_EQ(std::ranges::count(progress->calls, "Project Preview - Completing"), 0);
+}
+
+TEST_P(HostPreviewTest, JoinsWhatTheCutsHaveLeftOfAClip)
+{
+    changes().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00");
+    host.carryOver("01:00:05:00", "01:00:20:00", "01:00:05:00", "01:00:20:00");
+
+    previewAll();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "one 86400-86410", "two 86410-86420"}));
+}
+
+TEST_P(HostPreviewTest, MakesTheTrackOfTheNewPictureBeforeThoseOfTheMarkers)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:05:00"), core::Timecode("00:00:04:00")),
+        false);
+
+    previewAll();
+
+    EXPECT_EQ(standin::tests::namesOf(*host.root()), (Entries{u"DX", u"New Video", u"Cadrel Markers"}));
 }
 
 TEST_P(HostPreviewTest, WritesTheNewPictureInThePreview)
@@ -309,6 +351,28 @@ TEST_P(HostPreviewTest, LocksTheTracksThatItShows)
     EXPECT_TRUE(isLocked(own)) << "That is the user's lock.";
 }
 
+TEST_P(HostPreviewTest, LeavesALockAloneThatTheUserHasSetSince)
+{
+    const auto lock = [&] { query<ITrackNode>(track)->setFlag(TrackFlag::Lock, true); };
+    const auto switchOnAndOff = [&] {
+        adapter().setPreviewActive(true);
+        adapter().setPreviewActive(false);
+    };
+    previewAll();
+    adapter().setPreviewActive(false);
+    lock();
+    switchOnAndOff();
+    EXPECT_TRUE(isLocked(track));
+
+    query<ITrackNode>(track)->setFlag(TrackFlag::Lock, false);
+    previewAll();
+    ASSERT_TRUE(host.undo());
+    ASSERT_FALSE(isLocked(track));
+    lock();
+    switchOnAndOff();
+    EXPECT_TRUE(isLocked(track));
+}
+
 TEST_P(HostPreviewTest, ConformsUnderItsOwnLocks)
 {
     previewAll();
@@ -352,7 +416,67 @@ TEST_P(HostPreviewTest, KeepsWhatItHasDoneWhenItsEndFails)
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview"}));
 }
 
-TEST_P(HostPreviewTest, EndsAllTheSameWhereTheTransportIsGone)
+TEST_P(HostPreviewTest, SaysThatItIsIncompleteWhereItsEventsCannotFollowTheUndoList)
+{
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->addsStep = [](IEditStep* step) { return dynamic_cast<PreviewEventsStep*>(step) == nullptr; };
+    host.altered.replace(IEditService::iid, edits);
+
+    previewAll();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview (incomplete)"}));
+    EXPECT_FALSE(host.isEditOpen());
+}
+
+TEST_P(HostPreviewTest, IsNotRequestedWhereTheModelCannotBeKept)
+{
+    adapter().setPreviewActive(true);
+    ASSERT_EQ(adapter().startPreview(firstChange(), 0, 0, 1), Result::Ok);
+    host.model().oldEdl().add(std::make_shared<UnwritableEvent>());
+
+    EXPECT_EQ(adapter().startPreview(secondChange(), 0, 0, 1), Result::OutOfRange);
+    EXPECT_TRUE(adapter().isPreviewActive());
+
+    host.model().oldEdl().clear();
+    host.idle();
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "one 86410-86420"}))
+        << "The request before it stays.";
+}
+
+TEST_P(HostPreviewTest, GoesBackToWhenItWasOffAlsoWhereTheFirstRequestWasRefused)
+{
+    adapter().setPreviewActive(true);
+    host.model().oldEdl().add(std::make_shared<UnwritableEvent>());
+    ASSERT_EQ(adapter().startPreview(changes(), 0, 0, 1), Result::OutOfRange);
+    host.model().oldEdl().clear();
+    host.preview(changes());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_FALSE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, KeepsWhatItCanOfHowEverythingStood)
+{
+    // From a preview before, which stood elsewhere.
+    host.model().setProperty(PropertyKey::TransportCycleLower, core::Variant(1.0));
+    host.model().setProperty(PropertyKey::TransportCycleUpper, core::Variant(2.0));
+    host.altered.hide(ITransportControl::iid);
+    host.project.announceStoring();
+    host.disconnect();
+    host.connect();
+
+    EXPECT_EQ(thrownBy([&] { adapter().setPreviewActive(true); }), Result::HostObjectMissing);
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+    core::Variant left;
+    EXPECT_EQ(host.model().getProperty(PropertyKey::ProjectCycleLeft, left), Result::Ok);
+    EXPECT_EQ(left.toDouble(), 3.0);
+    EXPECT_FALSE(host.model().hasProperty(PropertyKey::TransportCycleLower)) << "That would be restored at the end.";
+    EXPECT_FALSE(host.model().hasProperty(PropertyKey::TransportCycleUpper));
+}
+
+TEST_P(HostPreviewTest, EndsAllTheSameWhereTheCycleCannotBeRestored)
 {
     previewAll();
     host.model().setProperty(PropertyKey::TransportCycleLower, core::Variant(9.0));
@@ -441,6 +565,20 @@ TEST_P(HostPreviewTest, ComesBackWhenItsEndIsUndone)
     EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
 }
 
+TEST_P(HostPreviewTest, UnlocksTheTracksThatTheUndoOfItsEndHasLockedAgain)
+{
+    previewAll();
+    adapter().setPreviewActive(false);
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(isLocked(track));
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_FALSE(isLocked(track));
+    host.conform();
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
 TEST_P(HostPreviewTest, TellsThatItIsSwitched)
 {
     RecordingListener heard;
@@ -509,6 +647,36 @@ TEST_P(HostPreviewTest, GoesBackToAPreviewThatWasOnWhenItWasNeverSwitchedOn)
     ASSERT_TRUE(host.undo());
 
     EXPECT_TRUE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, GoesBackToAPreviewThatWasOnAlsoWhereItWasSwitchedOffBefore)
+{
+    adapter().setPreviewActive(true);
+    adapter().setPreviewActive(false);
+    host.model().setPreviewActive(true);
+    host.preview(changes());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, ReportsNoProgressOnceItIsOver)
+{
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    host.altered.replace(IEditService::iid, edits);
+    host.settings().setCreateOverlapMarkers(true);
+    previewAll();
+    int steps = 0;
+    edits->beforeDelete = [&] {
+        ++steps;
+        const double time = host.onClock(1.0);
+        EXPECT_NO_THROW(adapter().generateMarkers({{time, time, "overlap", core::MarkerKind::Overlap}}));
+    };
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(steps, 1);
 }
 
 // The end of the preview that leaves it switched on.
@@ -596,6 +764,18 @@ TEST_P(HostPreviewTest, IsForgottenWhenTheProjectChanges)
     EXPECT_TRUE(adapter().isPreviewActive());
 }
 
+TEST_P(HostPreviewTest, GoesBackToAPreviewThatWasOnWhenTheProjectChangedMeanwhile)
+{
+    adapter().setPreviewActive(true);
+    host.application.activateProject(&host.application.createProject());
+    host.application.activateProject(&host.project);
+    host.preview(changes());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+}
+
 TEST_P(HostPreviewTest, BelongsToItsProject)
 {
     previewAll();
@@ -642,6 +822,21 @@ TEST_P(HostPreviewTest, GoesOnAfterASaveAndALoad)
     EXPECT_FALSE(isLocked(track));
     EXPECT_EQ(transportCycle(), Span(4.0, 9.0));
     EXPECT_TRUE(host.alerts->messages.empty());
+}
+
+TEST_P(HostPreviewTest, LeavesNoTrackLockedThatNothingCouldUnlock)
+{
+    previewAll();
+    host.project.announceStoring();
+    ASSERT_TRUE(isLocked(track));
+    host.project.setAttribute(AttributeKey::StorageChecksum, FVariant::integer(1), true);
+    host.adapter().projectClosing(host.document(), 0);
+    host.adapter().projectOpened(host.document());
+    host.adapter().projectActivated(host.document());
+
+    EXPECT_EQ(host.alerts->messages.size(), 1U);
+    EXPECT_FALSE(adapter().isPreviewActive());
+    EXPECT_FALSE(isLocked(track));
 }
 
 // Memos.
@@ -737,6 +932,75 @@ TEST_P(HostMemoTest, StayWhenThePreviewIsUndone)
     host.addPointMarker(memos, u"late", host.inHost(8.0));
 
     EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "late 8-8", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, TellTheHostNoFailureButTheOne)
+{
+    const auto refusing = makeCounted<AlteredEdits>(host.context());
+    refusing->removes = false;
+    int32 answer = ResultOk;
+    Texts calls;
+    const auto hook = makeCounted<standin::tests::Recorder>(calls);
+    const auto manager = service<IProjectManager>(host.context());
+    // It is called before the adapter, which therefore has the edit still to follow.
+    host.project.announceStoring();
+    host.disconnect();
+    ASSERT_EQ(manager->addNotification(hook.get()), ResultOk);
+    host.connect();
+    previewAll();
+    host.idle();
+    hook->whenCalled = [&](const std::string& call) {
+        if (call == "edited")
+            answer = adapter().projectEdited(host.document(), refusing.get());
+    };
+
+    edit([&] { host.transaction()->remove(memos.get(), copyOf(u"click").get()); });
+
+    EXPECT_EQ(answer, Result::HostObjectMissing);
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "far 30-30"})) << "The host's own call has removed it.";
+    manager->removeNotification(hook.get());
+}
+
+TEST_P(HostMemoTest, StayWhereThePreviewCannotFollowTheUndoList)
+{
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->addsStep = [](IEditStep* step) { return dynamic_cast<PreviewEventsStep*>(step) == nullptr; };
+    host.altered.replace(IEditService::iid, edits);
+    previewAll();
+    host.idle();
+
+    edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
+
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, FollowTheEventsThatAreGivenAlone)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+    const Node click = copyOf(u"click");
+
+    EXPECT_EQ(adapter().setProjectEvents(core::EventList()), Result::Ok);
+
+    edit([&] { click->setStart(nullptr, 0, inPreview(17.0)); });
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, StayWhenAPreviewEndsOfWhichTheOffsetIsLost)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+    const Node click = copyOf(u"click");
+    host.model().removeProperty(PropertyKey::PreviewOffset);
+
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+
+    // The next request finds the place of a preview again.
+    host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(Day));
+    edit([&] { click->setStart(nullptr, 0, inPreview(17.0)); });
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "far 30-30"}));
 }
 
 } // namespace cadrel::host::tests

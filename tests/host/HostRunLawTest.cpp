@@ -3,6 +3,7 @@
 
 #include "core/DataModel.h"
 #include "core/EventBase.h"
+#include "core/SecondsRange.h"
 #include "core/Timecode.h"
 #include "host/Host.h"
 #include "host/TrackRole.h"
@@ -19,6 +20,7 @@
 #include <rapidcheck/gtest.h>
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 #include <cstdint>
 #include <memory>
@@ -92,6 +94,32 @@ public:
         }
         return std::nullopt;
     }
+    /// What is replaced by nothing between two events that follow on one another in the list.
+    std::vector<core::SecondsRange> gaps()
+    {
+        std::vector<core::SecondsRange> found;
+        for (std::size_t index = 1; index < changes.size(); ++index) {
+            // No event and no range begins or ends within a piece.
+            const double start = changes[index - 1].destination + changes[index - 1].length;
+            const double end = changes[index].destination;
+            std::vector<double> bounds{start, end};
+            for (const Carried& carried : changes) {
+                bounds.push_back(carried.destination);
+                bounds.push_back(carried.destination + carried.length);
+            }
+            const core::Settings& settings = model().settings();
+            bounds.push_back(settings.preserveMaterialBefore() - project.timeOrigin());
+            bounds.push_back(settings.preserveMaterialAfter() - project.timeOrigin());
+            std::erase_if(bounds, [&](double time) { return time < start || time > end; });
+            std::ranges::sort(bounds);
+            for (std::size_t at = 1; at < bounds.size(); ++at) {
+                const double middle = (bounds[at - 1] + bounds[at]) / 2.0;
+                if (bounds[at] - bounds[at - 1] > 0.02 && !sourceOf(middle) && isReplaced(middle))
+                    found.push_back({bounds[at - 1], bounds[at]});
+            }
+        }
+        return found;
+    }
     bool isRestricted() { return model().settings().restrictRange(); }
     /// Whether the run replaces what stands at the instant.
     bool isReplaced(double time)
@@ -153,6 +181,7 @@ private:
         settings.setCreateAutomationWarningMarkers(false);
         settings.setCreateOverlapMarkers(false);
         settings.setCreateDestinationMarkers(m_chance.oneIn(2));
+        settings.setCreateVirginTerritories(m_chance.oneIn(2));
         if (m_chance.oneIn(3))
             settings.setApplyTo(core::ApplyTo::SelectedTracks);
         const double origin = project.timeOrigin();
@@ -220,6 +249,18 @@ bool isLevelFrom(const standin::Envelope& curve, double time)
     return true;
 }
 
+/// Whether a curve that has points runs straight from just behind the one time to just before the other.
+bool isStraight(const standin::Envelope& curve, double start, double end)
+{
+    constexpr double Hair = 1e-4;
+    const auto at = [&](double part) {
+        return curve.valueBehind(std::lerp(start + Hair, end - Hair, part)).value_or(0.0);
+    };
+    return std::ranges::all_of(std::array{0.25, 0.5, 0.75}, [&](double part) {
+        return std::abs(at(part) - std::lerp(at(0.0), at(1.0), part)) < 1e-5;
+    });
+}
+
 /// Nothing to conform is no run; the law says nothing of it.
 bool canRun(RandomRun& run)
 {
@@ -250,6 +291,8 @@ RC_GTEST_PROP(HostRunLaw, EachInstantHoldsWhatStoodAtItsSource, ())
         }
     }
 
+    const std::vector<core::SecondsRange> gaps = run.gaps();
+
     run.conform();
 
     for (std::size_t index = 0; index < tracks.size(); ++index) {
@@ -263,6 +306,12 @@ RC_GTEST_PROP(HostRunLaw, EachInstantHoldsWhatStoodAtItsSource, ())
         }
         if (!isConformed[index])
             RC_ASSERT(standin::tests::timesOf({tracks[index]}) == times[index]);
+        else if (run.model().settings().createVirginTerritories()) {
+            for (const auto& [start, end] : gaps) {
+                for (const auto& [number, curve] : track.curves())
+                    RC_ASSERT(isStraight(*curve, start, end));
+            }
+        }
         // Nothing stays behind where the run has worked.
         RC_ASSERT(track.lastEnd() < EndOfFilm);
         for (const auto& [number, curve] : track.curves())
@@ -319,9 +368,12 @@ RC_GTEST_PROP(HostRunLaw, APreviewLeavesTheFilmAsItIs, ())
     }
 
     run.adapter->setPreviewActive(false);
-    expectFilm();
-    for (const standin::Track* const track : tracks)
-        RC_ASSERT(track->lastEnd() < EndOfFilm);
+    for (std::size_t index = 0; index < tracks.size(); ++index) {
+        // The automation too.
+        for (std::size_t at = 0; at < instants.size(); ++at)
+            RC_ASSERT(Heard::at(*tracks[index], instants[at]) == before[index][at]);
+        RC_ASSERT(tracks[index]->lastEnd() < EndOfFilm);
+    }
 }
 
 } // namespace cadrel::host::tests

@@ -1,6 +1,7 @@
 // A run from its request to the undo list, on the tracks of a project.
 
 #include "core/ChangeContext.h"
+#include "core/Cut.h"
 #include "host/Host.h"
 #include "host/Project.h"
 #include "host/TrackRole.h"
@@ -8,6 +9,7 @@
 #include "tests/core/RecordingListener.h"
 #include "tests/host/AdaptedHost.h"
 #include "tests/host/WatchedProgress.h"
+#include "tests/standin/TestHost.h"
 #include "velmark/Transport.h"
 
 #include <gtest/gtest.h>
@@ -15,6 +17,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::host::tests {
@@ -25,6 +28,7 @@ using core::ChangeContext;
 using util::Result;
 
 using Texts = std::vector<std::string>;
+using Tracks = std::vector<std::wstring>;
 using Entries = AdaptedHost::Entries;
 
 /// What the listeners are told that has to do with runs.
@@ -96,6 +100,15 @@ protected:
         auto progress = makeCounted<WatchedProgress>();
         host.altered.replace(IProgressService::iid, progress);
         return progress;
+    }
+    /// The tracks that a run would change, as the adapter sees them.
+    Tracks candidates()
+    {
+        const auto cut = host.adapter().makeCutEvents(host.model().changeEdl().eventAt(0));
+        Tracks names;
+        for (const auto& cutEvent : cut->cutEvents())
+            names.push_back(cutEvent->getTrackName());
+        return names;
     }
     /// Requests a run, so that the preview offset is there: the bytes that it begins with.
     std::string requestRun()
@@ -180,9 +193,11 @@ TEST_P(HostRunTest, BringsTheMarkersToTheNewProgramme)
     host.settings().setCreateInsertMarkers(true);
     const auto shot = cadrel::tests::makeEvent("B002", "02:00:00:00", "02:00:05:00", "01:00:20:00", "01:00:25:00", 3);
     host.model().newEdl().add(shot);
+    const auto progress = watch();
 
     host.conform();
 
+    EXPECT_EQ(std::ranges::count(progress->calls, "setRange 1"), 1) << "A stage of one marker.";
     // What no change event covers is new: the whole of the one new shot.
     const Texts inserts = host.contentOf(host.trackNamed(u"Insert"));
     ASSERT_EQ(inserts.size(), 1U);
@@ -212,6 +227,43 @@ TEST_P(HostRunTest, ChangesTheSelectedTracksAlone)
 
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
     EXPECT_EQ(host.contentOf(other), Texts{"door 0-2"});
+}
+
+TEST_P(HostRunTest, JoinsNothingOnATrackThatTakesNoPart)
+{
+    const auto other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"door", 0.0, 10.0);
+    // Written over itself it is in two pieces.
+    host.edit(u"Split", [&] {
+        const auto tracks = create<IObjectList>(host.context());
+        tracks->add(other.get(), 0);
+        host.editService()->copyRange(host.document(), tracks.get(), 0, host.inHost(0.0), host.inHost(5.0),
+                                      host.inHost(0.0));
+    });
+    const Texts pieces{"door 0-5", "door 5-10"};
+    ASSERT_EQ(host.contentOf(other), pieces);
+    dynamic_cast<standin::Node&>(*track).setSelected(true);
+    host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
+
+    host.conform();
+    EXPECT_EQ(host.contentOf(other), pieces);
+
+    // They are two that it would join.
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:20:00", "01:00:00:00", "01:00:20:00");
+    host.settings().setApplyTo(core::ApplyTo::AllTracks);
+    host.conform();
+    EXPECT_EQ(host.contentOf(other), Texts{"door 0-10"});
+}
+
+TEST_P(HostRunTest, FindsThePlaceOfThePreviewAgainThatWasLostSinceItsRequest)
+{
+    requestRun();
+    host.model().removeProperty(core::PropertyKey::PreviewOffset);
+
+    host.idle();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
 }
 
 TEST_P(HostRunTest, ChangesOnlyTheRangeToWhichItIsRestricted)
@@ -253,6 +305,23 @@ TEST_P(HostRunTest, LeavesOutWhatHasNoTimecodes)
     EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
 }
 
+TEST_P(HostRunTest, CarriesTheRestOverWhereADestinationIsReversed)
+{
+    const core::Settings defaults;
+    host.settings().setCreateDestinationMarkers(defaults.createDestinationMarkers());
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:40:00", "01:00:35:00");
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    const Texts content = host.contentOf(track);
+    ASSERT_GE(content.size(), 2U);
+    EXPECT_EQ(content[0], "two 0-10");
+    EXPECT_EQ(content[1], "one 10-20");
+    EXPECT_EQ(host.contentOf(host.trackNamed(u"Destination")),
+              (Texts{"Event: 2 - A001  0-10", "Event: 1 - A001  10-20", "Event: 3 - A001  35-40"}));
+}
+
 TEST_P(HostRunTest, WritesTheNewPictureAtItsPlace)
 {
     host.model().videoList().add(
@@ -289,6 +358,25 @@ TEST_P(HostRunTest, LetsTheAutomationRunStraightOverWhatNothingCovers)
         EXPECT_NEAR(curve.valueBehind(host.inHost(time)).value_or(-1.0), onLine(time), 1e-6) << time;
 }
 
+TEST_P(HostRunTest, KeepsTheAutomationThatALaterEventBringsBetweenTwo)
+{
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00");
+    host.carryOver("01:00:10:00", "01:00:15:00", "01:00:10:00", "01:00:15:00");
+    host.carryOver("01:00:05:00", "01:00:10:00", "01:00:05:00", "01:00:10:00");
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    host.addPoint(track, volume, host.inHost(6.0), 0.25F);
+    host.addPoint(track, volume, host.inHost(7.0), 0.75F);
+    host.addPoint(track, volume, host.inHost(8.0), 0.25F);
+    host.settings().setCreateVirginTerritories(true);
+
+    host.conform();
+
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(track, volume));
+    for (const auto& [time, value] : {std::pair(5.5, 0.25), std::pair(6.5, 0.5), std::pair(7.0, 0.75)})
+        EXPECT_NEAR(curve.valueBehind(host.inHost(time)).value_or(-1.0), value, 1e-6) << time;
+}
+
 // The frame around a run.
 
 TEST_P(HostRunTest, ShowsHowFarItIs)
@@ -313,6 +401,16 @@ TEST_P(HostRunTest, ShowsHowFarItIs)
                             "Processing Project - Event: 1 - A001 ", "Processing Project - Event: 2 - A001 ",
                             "Processing Project - Overlap Markers", "Processing Project - Generate Markers",
                             "setRange 0", "Processing Project - Completing", "end"}));
+}
+
+TEST_P(HostRunTest, SeesTheTracksThatAreMadeAfterIt)
+{
+    host.conform();
+    EXPECT_EQ(candidates(), (Tracks{L"DX", L"Memos"}));
+
+    host.addTrack(TypeWord::Audio, u"FX");
+
+    EXPECT_EQ(candidates(), (Tracks{L"DX", L"Memos", L"FX"}));
 }
 
 TEST_P(HostRunTest, StopsTheTransportFirst)
@@ -443,6 +541,28 @@ TEST_P(HostRunTest, DoesNothingMoreOnceItIsCancelled)
     EXPECT_FALSE(host.trackNamed(u"New Video")) << "The first event was carried over, and that was all.";
 }
 
+TEST_P(HostRunTest, SeesNoTrackAnyMoreThatItsUndoTakesAway)
+{
+    Tracks seen;
+    Texts calls;
+    const auto dependent = makeCounted<standin::tests::Recorder>(calls);
+    dependent->whenCalled = [&](const std::string&) { seen = candidates(); };
+    const auto dependencies = service<IDependencyManager>(host.context());
+    ASSERT_EQ(dependencies->addDependent(host.document(), dependent.get()), ResultOk);
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") != std::string::npos)
+            progress->cancel();
+    };
+
+    host.conform();
+
+    ASSERT_EQ(host.undoNames(), entriesBefore);
+    EXPECT_EQ(calls, (Texts{"update", "update"})) << "The commit, and the undo.";
+    EXPECT_EQ(seen, Tracks{L"DX"});
+    dependencies->removeDependent(host.document(), dependent.get());
+}
+
 TEST_P(HostRunTest, TakesTheChangesOfTheModelBackWithTheRun)
 {
     // What stands in the model when the run begins comes back, and no more than that.
@@ -457,6 +577,26 @@ TEST_P(HostRunTest, TakesTheChangesOfTheModelBackWithTheRun)
     host.conform();
 
     EXPECT_FALSE(host.model().hasProperty(core::PropertyKey::LastEdlFolder));
+}
+
+TEST_P(HostRunTest, SaysThatItIsIncompleteWhereItIsCancelledAndCannotBeTakenBack)
+{
+    const std::string before = requestRun();
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") != std::string::npos)
+            progress->cancel();
+    };
+    host.altered.hide(IActionManager::iid);
+
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
+    EXPECT_FALSE(host.isEditOpen());
+    EXPECT_FALSE(host.application.idleManager().isBlocked());
+    EXPECT_EQ(progress->calls.back(), "end");
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.bytes(), before);
 }
 
 // Runs that fail.

@@ -20,8 +20,10 @@
 
 #include <cmath>
 #include <functional>
+#include <initializer_list>
 #include <sstream>
 #include <string>
+#include <utility>
 #include <vector>
 
 using namespace Velmark;
@@ -213,6 +215,23 @@ TEST_P(ProjectEditsTest, ACutHasAnEventForEachTrackAtTheTimesOfTheChangeEvent)
     EXPECT_FALSE(cut->cutEvents()[1]->isAudio());
 }
 
+TEST_P(ProjectEditsTest, ACutHasItsTimesFromDropFrameTimecodes)
+{
+    host.project.setFrameRate({29.97, FrameRateInfo::Flag::DropFrame | FrameRateInfo::Flag::PulledDown});
+    host.adapter.onProjectChanged();
+    timecodes.framerate = host.adapter.getFramerate();
+    addTrack(u"FX");
+
+    // An hour has 107892 frames, and the numbers ;00 and ;01 of each minute but every tenth are dropped.
+    const auto cut = host.adapter.makeCut(change("01:00:59:29", "01:01:00:02", "01:10:00:00", "01:10:00:01"));
+
+    ASSERT_EQ(cut->cutEvents().size(), 1U);
+    EXPECT_DOUBLE_EQ(cut->cutEvents()[0]->srcIn(), (107892 + 1799) / 29.97);
+    EXPECT_DOUBLE_EQ(cut->cutEvents()[0]->srcOut(), (107892 + 1800) / 29.97);
+    EXPECT_DOUBLE_EQ(cut->cutEvents()[0]->dstIn(), (107892 + 17982) / 29.97);
+    EXPECT_DOUBLE_EQ(cut->cutEvents()[0]->dstOut(), (107892 + 17983) / 29.97);
+}
+
 TEST_P(ProjectEditsTest, ACutLeavesOutLockedTracks)
 {
     addTrack(u"FX");
@@ -390,6 +409,19 @@ TEST_P(ProjectEditsTest, TheDestinationIsThatOfTheChangeEventWhateverWasTrimmed)
     EXPECT_EQ(contentOf(markerTrack(u"Destination")), Content{"preview: Event: 7 - A012  30-40"});
 }
 
+TEST_P(ProjectEditsTest, AReversedDestinationIsMarkedAllTheSame)
+{
+    addTrack(u"FX");
+    createMarkerTracks();
+
+    EXPECT_EQ(process(*host.adapter.makeCut(change("01:00:10:00", "01:00:20:00", "01:00:40:00", "01:00:30:00"))),
+              Result::Ok);
+    EXPECT_EQ(generate({{3605.0, 3602.0, "Insert: B", MarkerKind::Insert}}), Result::Ok);
+
+    EXPECT_EQ(contentOf(markerTrack(u"Destination")), Content{"preview: Event: 7 - A012  30-40"});
+    EXPECT_EQ(contentOf(markerTrack(u"Insert")), Content{"preview: Insert: B 2-5"});
+}
+
 TEST_P(ProjectEditsTest, ANameThatIsNoUtf8IsStillReadable)
 {
     createMarkerTracks();
@@ -427,6 +459,22 @@ TEST_P(ProjectEditsTest, WritesEachMarkerOnTheTrackOfItsKind)
     EXPECT_EQ(textOf(marker, AttributeKey::Reel), "");
     EXPECT_NE(marker->hasAttribute(AttributeKey::EventUserId), ResultOk);
     EXPECT_EQ(progress.ticks, (std::vector<std::uint64_t>{1, 1, 1, 1, 1}));
+}
+
+TEST_P(ProjectEditsTest, AMarkerOfAHundredthOfASecondIsAPoint)
+{
+    createMarkerTracks();
+
+    EXPECT_EQ(generate({{3601.0, 3601.01, "a hundredth", MarkerKind::Insert},
+                        {3602.0, 3602.02, "two hundredths", MarkerKind::Insert}}),
+              Result::Ok);
+
+    const auto markers = childrenOf(*markerTrack(u"Insert"));
+    ASSERT_EQ(markers.size(), 2U);
+    EXPECT_FALSE(markers[0]->isType(TypeWord::Range));
+    EXPECT_TRUE(markers[1]->isType(TypeWord::Range));
+    EXPECT_EQ(contentOf(markerTrack(u"Insert")),
+              (Content{"preview: a hundredth 1-1", "preview: two hundredths 2-2.02"}));
 }
 
 TEST_P(ProjectEditsTest, AMarkerWithoutATrackIsPassedOver)
@@ -530,6 +578,24 @@ TEST_P(ProjectEditsTest, ARestrictedRunMayBeginBeforeTheClock)
     EXPECT_EQ(contentOf(fx), (Content{"new 7-20", "behind 20-30"}));
 }
 
+TEST_P(ProjectEditsTest, ARestrictedRunReadsNothingThatStandsBeforeThePreview)
+{
+    AlteredContext altered(host.context());
+    const auto edits = makeCounted<EditRecorder>();
+    altered.replace(IEditService::iid, edits);
+    Project project(&altered, host.document(), nullptr);
+    project.computePreviewOffset();
+    project.model().settings().setRestrictRange(true);
+    project.model().settings().setPreserveMaterial(-100.0, 3620.0);
+
+    host.edit(u"Edit", [&] { project.completeApply(*host.transaction()); });
+
+    ASSERT_EQ(edits->copies.size(), 1U);
+    EXPECT_EQ(edits->copies[0].start, Day - host.origin);
+    EXPECT_EQ(edits->copies[0].end, Day + film(20.0));
+    EXPECT_EQ(edits->copies[0].destination, -host.origin);
+}
+
 TEST_P(ProjectEditsTest, AnEmptyRangeReplacesNothing)
 {
     const auto fx = addTrack(u"FX");
@@ -578,6 +644,25 @@ TEST_P(ProjectEditsTest, ClearsThePreviewAndUnlocksTheTracks)
     EXPECT_FALSE(host.handle(fx).hostLocked());
 }
 
+TEST_P(ProjectEditsTest, ClearsTheAutomationOfThePreviewThatReachesFurtherThanAllEvents)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    const auto fx = addTrack(u"FX");
+    addClip(fx, u"old", 5.0, 15.0);
+    host.addPoint(fx, volume, film(10.0), 0.25F);
+    // The project ends at 15 s of the film, and this is the copy of what stands a quarter of an hour behind that.
+    host.addPoint(fx, volume, film(Day + 900.0), 0.25F);
+    host.addPoint(fx, volume, film(Day + 901.0), 0.75F);
+    host.addPoint(fx, volume, film(Day + 902.0), 0.25F);
+
+    EXPECT_EQ(edit([](Project& project, IEditTransaction& transaction) { project.clearPreview(transaction); }),
+              Result::Ok);
+
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(fx, volume));
+    for (const double time : {10.0, Day + 900.5, Day + 901.0, 2.0 * Day})
+        EXPECT_EQ(curve.valueBehind(film(time)), 0.25) << time;
+}
+
 TEST_P(ProjectEditsTest, ThePreviewCannotBeClearedWithoutOffsetOrTransaction)
 {
     EXPECT_EQ(thrownBy([&] { host.adapter.clearPreview(*host.transaction()); }), Result::HostCallFailed);
@@ -599,8 +684,8 @@ TEST_P(ProjectEditsTest, ClosesARangeOnTheTracksOfTheRunInTimesOfTheHost)
     altered.replace(IEditService::iid, edits);
     Project project(&altered, host.document(), nullptr);
 
-    project.closeRange(*host.transaction(), false, 3610.0, 3620.0);
-    project.closeRange(*host.transaction(), true, 3610.0, 3620.0);
+    project.closeRange(false, 3610.0, 3620.0);
+    project.closeRange(true, 3610.0, 3620.0);
 
     ASSERT_EQ(edits->closed.size(), 2U);
     EXPECT_EQ(edits->closed[0].tracks, 2);
@@ -617,7 +702,7 @@ TEST_P(ProjectEditsTest, ClosingARangeFailsOnlyWhereTheHostRefuses)
     Project project(&altered, host.document(), nullptr);
     const auto closing = [&](int32 result) {
         edits->result = result;
-        return thrownBy([&] { project.closeRange(*host.transaction(), false, 3610.0, 3620.0); });
+        return thrownBy([&] { project.closeRange(false, 3610.0, 3620.0); });
     };
 
     EXPECT_EQ(closing(0), Result::Ok);
@@ -642,6 +727,14 @@ protected:
         cuts.add(host.adapter.makeCut(change("01:00:00:00", "01:00:10:00", "01:00:10:00", "01:00:20:00")));
         cuts.add(host.adapter.makeCut(change("01:00:10:00", "01:00:20:00", "01:00:30:00", "01:00:40:00")));
         cuts.add(host.adapter.makeCut(change("01:00:20:00", "01:00:30:00", "01:00:40:00", "01:00:50:00")));
+    }
+
+    /// Cuts of these destinations alone, in this order.
+    void listCuts(std::initializer_list<std::pair<const char*, const char*>> destinations)
+    {
+        cuts.clear();
+        for (const auto& [dstIn, dstOut] : destinations)
+            cuts.add(host.adapter.makeCut(change("01:00:00:00", "01:00:10:00", dstIn, dstOut)));
     }
 
     Result::Type mark()
@@ -691,6 +784,46 @@ TEST_P(ProjectVirginTerritoryTest, CutsWhoseChangeEventsMeetAreLeftAlone)
     mark();
 
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, WhatAnotherCutHasWrittenInAGapStays)
+{
+    listCuts({{"01:00:10:00", "01:00:20:00"}, {"01:00:30:00", "01:00:40:00"}, {"01:00:20:00", "01:00:30:00"}});
+
+    EXPECT_EQ(mark(), Result::Ok);
+
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, WhatAnotherCutLeavesOfAGapIsFilled)
+{
+    listCuts({{"01:00:10:00", "01:00:20:00"}, {"01:00:30:00", "01:00:40:00"}, {"01:00:22:00", "01:00:28:00"}});
+
+    EXPECT_EQ(mark(), Result::Ok);
+
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 22.0, 25.0, 28.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, WhatALongCutHasWrittenUnderALaterOneStays)
+{
+    listCuts({{"01:00:10:00", "01:00:40:00"}, {"01:00:12:00", "01:00:20:00"}, {"01:00:40:00", "01:00:50:00"}});
+
+    EXPECT_EQ(mark(), Result::Ok);
+
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, AGapThatTwoPairsOfCutsShareIsFilledOnce)
+{
+    // From 40 to 44 s lies between the first two, and between the last two.
+    listCuts({{"01:00:10:00", "01:00:20:00"},
+              {"01:00:44:00", "01:00:46:00"},
+              {"01:00:30:00", "01:00:40:00"},
+              {"01:00:48:00", "01:00:50:00"}});
+
+    EXPECT_EQ(mark(), Result::Ok);
+
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 35.0, 40.0, 44.0, 45.0, 46.0, 48.0}));
 }
 
 TEST_P(ProjectVirginTerritoryTest, LockedAndUnselectedTracksAreLeftAlone)

@@ -404,14 +404,56 @@ TEST_F(ProjectStorageTest, FindsTheTracksThatItHeldLocked)
     const auto lockedByTheUser = host.addTrack(TypeWord::Audio, u"Music");
     host.handle(held).setLock(true);
     requireOk(query<ITrackNode>(lockedByTheUser)->setFlag(TrackFlag::Lock, true));
+    host.adapter.model().setPreviewActive(true);
     host.adapter.save();
 
     Project opened(host.context(), host.document(), nullptr);
     opened.load();
+    EXPECT_TRUE(host.handle(held).hostLocked()) << "The preview goes on.";
     opened.setTracksLocked(false);
 
     EXPECT_FALSE(host.handle(held).hostLocked());
     EXPECT_TRUE(host.handle(lockedByTheUser).hostLocked());
+}
+
+TEST_F(ProjectStorageTest, UnlocksWhatItHeldForAPreviewThatIsGone)
+{
+    const auto held = host.addTrack(TypeWord::Audio, u"FX");
+    const auto markers = host.addTrack(TypeWord::Marker, u"Insert");
+    const auto lockedByTheUser = host.addTrack(TypeWord::Audio, u"Music");
+    requireOk(query<ITrackNode>(lockedByTheUser)->setFlag(TrackFlag::Lock, true));
+    host.adapter.model().setPreviewActive(true);
+    const Bytes block = contentOf(host.adapter.model());
+    const auto expectUnlocked = [&] {
+        for (const auto& track : {held, markers}) {
+            EXPECT_FALSE(host.handle(track).hostLocked());
+            EXPECT_FALSE(host.handle(track).hasLockState());
+        }
+        EXPECT_TRUE(host.handle(lockedByTheUser).hostLocked());
+    };
+    const auto lock = [&] {
+        for (const auto& track : {held, markers})
+            host.handle(track).setLock(true);
+    };
+
+    lock();
+    EXPECT_EQ(loadFailure(), Result::Ok) << "Nothing is stored.";
+    expectUnlocked();
+
+    lock();
+    store(block, archiveOf(block).crc32() ^ 1U);
+    EXPECT_EQ(loadFailure(), Result::ChecksumMismatch);
+    expectUnlocked();
+}
+
+TEST_F(ProjectStorageTest, GivesAnEmptyModelWhereTheTracksCannotBeRead)
+{
+    const auto project = FakeProject::withoutUsableTrack();
+    Project opened(host.context(), project.get(), nullptr);
+
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::HostObjectMissing);
+
+    EXPECT_EQ(contentOf(opened.model()), contentOf(Project(host.context(), project.get(), nullptr).model()));
 }
 
 } // namespace cadrel::host

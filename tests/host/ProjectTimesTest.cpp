@@ -8,12 +8,16 @@
 #include "tests/core/TestProject.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AlteredDocument.h"
+#include "tests/host/FakeProject.h"
 #include "tests/host/TrackHost.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>
 
+#include <array>
 #include <limits>
+#include <string>
+#include <utility>
 #include <vector>
 
 using namespace Velmark;
@@ -24,6 +28,7 @@ using cadrel::util::Result;
 namespace cadrel::host {
 
 using tests::AlteredDocument;
+using tests::FakeProject;
 using tests::TrackHost;
 using RateFlag = FrameRateInfo::Flag;
 
@@ -34,9 +39,32 @@ constexpr double Day = 86400.0;
 class Told : public ProjectListener {
 public:
     void projectChanging(Project&) override {}
-    void projectChanged(Project&) override { ++times; }
+    void projectChanged(Project&) override
+    {
+        ++times;
+        if (failure != Result::Ok)
+            throw failure;
+    }
 
     int times = 0;
+    Result::Type failure = Result::Ok; ///< what it throws when it is told
+};
+
+/// Has all locators of a project but one.
+class LocatorsBut : public Implements<LocatorsBut, FObject, ILocators> {
+public:
+    static constexpr const char* ClassName = "LocatorsBut";
+
+    LocatorsBut(ILocators* locators, std::string missing) : m_locators(locators), m_missing(std::move(missing)) {}
+
+    IParameter* getParameter(const char* name) override
+    {
+        return name == m_missing ? nullptr : m_locators->getParameter(name);
+    }
+
+private:
+    ILocators* m_locators;
+    std::string m_missing;
 };
 
 /// With a clock that begins at 0 and with one that begins at 01:00:00:00. The tests give times of the clock.
@@ -185,6 +213,42 @@ TEST_P(ProjectTimesTest, TellsItsListenersOfAnEdit)
 
     EXPECT_EQ(listener.times, 1);
     host.adapter.removeListener(&listener);
+}
+
+TEST_P(ProjectTimesTest, AListenerThatFailsKeepsNoOtherFromBeingTold)
+{
+    std::array<Told, 3> listeners;
+    for (Told& listener : listeners)
+        host.adapter.addListener(&listener);
+    listeners[1].failure = Result::InvalidArgument;
+
+    EXPECT_EQ(thrownBy([&] { host.adapter.onProjectChanged(); }), Result::InvalidArgument);
+    EXPECT_EQ(thrownBy([&] { host.adapter.onProjectEdited(*host.transaction()); }), Result::InvalidArgument);
+    for (const Told& listener : listeners)
+        EXPECT_EQ(listener.times, 2);
+
+    host.project.setFrameRate({0.0, 0});
+    EXPECT_EQ(thrownBy([&] { host.adapter.onProjectChanged(); }), Result::NotSupported)
+        << "The first failure is raised.";
+    for (Told& listener : listeners) {
+        EXPECT_EQ(listener.times, 3);
+        host.adapter.removeListener(&listener);
+    }
+}
+
+TEST_P(ProjectTimesTest, TellsItsListenersOfAnEditThatTheMemosCannotFollow)
+{
+    const auto broken = FakeProject::withoutUsableTrack();
+    Project project(host.context(), broken.get(), nullptr);
+    project.model().setPreviewActive(true);
+    project.model().setProperty(core::PropertyKey::PreviewOffset, core::Variant(Day));
+    Told listener;
+    project.addListener(&listener);
+
+    EXPECT_EQ(thrownBy([&] { project.onProjectEdited(*host.transaction()); }), Result::HostObjectMissing);
+
+    EXPECT_EQ(listener.times, 1);
+    project.removeListener(&listener);
 }
 
 TEST_P(ProjectTimesTest, KnowsTheOriginAndTheEndOfTheProject)
@@ -358,6 +422,23 @@ TEST_P(ProjectTimesTest, LocatorsCanBeMissingOrRefused)
     EXPECT_EQ(thrownBy([&] { project.getLocators(left, right); }), Result::HostObjectMissing);
     EXPECT_EQ(thrownBy([&] { project.setLocators(false, 0.0, 1.0); }), Result::HostObjectMissing);
     EXPECT_EQ(thrownBy([&] { host.adapter.setLocators(false, 1e12, 2e12); }), Result::HostCallFailed);
+}
+
+TEST_P(ProjectTimesTest, NeedsBothLocators)
+{
+    for (const char* missing : {ParameterName::LeftTime, ParameterName::RightTime}) {
+        const auto locators = makeCounted<LocatorsBut>(host.document()->getLocators(), missing);
+        const auto document = makeCounted<AlteredDocument>(host.document());
+        document->locators = locators.get();
+        Project project(host.context(), document.get(), nullptr);
+        double left = 0.0;
+        double right = 0.0;
+
+        EXPECT_EQ(thrownBy([&] { project.getLocators(left, right); }), Result::HostObjectMissing);
+        EXPECT_EQ(thrownBy([&] { project.setLocators(false, 1.0, 2.0); }), Result::HostObjectMissing);
+    }
+    EXPECT_EQ(host.project.locatorLeft().getValue(), 0.0);
+    EXPECT_EQ(host.project.locatorRight().getValue(), 0.0);
 }
 
 TEST_P(ProjectTimesTest, TheApplyRangeIsAllThatLiesBeforeThePreview)

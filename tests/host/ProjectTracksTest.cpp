@@ -6,13 +6,16 @@
 #include "tests/core/TestProject.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AlteredDocument.h"
+#include "tests/host/FakeProject.h"
 #include "tests/host/TrackHost.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>
 
 #include <cstdint>
+#include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 using namespace Velmark;
@@ -24,6 +27,8 @@ using standin::tests::namesOf;
 namespace cadrel::host {
 
 using tests::AlteredDocument;
+using tests::FakeNode;
+using tests::FakeProject;
 using tests::TrackHost;
 
 namespace {
@@ -44,7 +49,37 @@ public:
     std::wstring translate(const std::wstring& text) const override { return text + L"!"; }
 };
 
-class ProjectTracksTest : public testing::Test {
+/// A track of a bad host that tells whether it is locked, and may refuse it.
+class LockTrack : public FakeNode {
+public:
+    LockTrack(std::set<std::string> kinds, std::int32_t videoRole) : m_videoRole(videoRole)
+    {
+        words = std::move(kinds);
+    }
+
+    bool isLocked = false;
+
+    int32 setFlag(const char*, bool flag) override
+    {
+        if (setterResult == ResultOk)
+            isLocked = flag;
+        return setterResult;
+    }
+    int32 getFlag(const char*) override { return isLocked ? ResultOk : ResultFalse; }
+    int32 getAttribute(const char* key, FVariant& value) override
+    {
+        if (m_videoRole == 0 || std::string(key) != AttributeKey::VideoType)
+            return ResultFalse;
+        value = FVariant::integer(m_videoRole);
+        return ResultOk;
+    }
+
+private:
+    std::int32_t m_videoRole;
+};
+
+/// With a clock that begins at 0 and with one that begins at 01:00:00:00.
+class ProjectTracksTest : public testing::TestWithParam<double> {
 protected:
     void createMarkerTracks() { createMarkerTracks(host.adapter); }
     void createMarkerTracks(Project& project)
@@ -74,12 +109,14 @@ protected:
     Track trackNamed(const char16_t* name) { return host.handle(find(name)); }
 
     cadrel::tests::TestProject timecodes;
-    TrackHost host{3600.0};
+    TrackHost host{GetParam()};
 };
+
+INSTANTIATE_TEST_SUITE_P(Origins, ProjectTracksTest, testing::Values(0.0, 3600.0));
 
 } // namespace
 
-TEST_F(ProjectTracksTest, GathersTheTracksDepthFirst)
+TEST_P(ProjectTracksTest, GathersTheTracksDepthFirst)
 {
     host.addTrack(TypeWord::Audio, u"1");
     const auto folder = host.addTrack(TypeWord::Folder, u"2");
@@ -92,7 +129,7 @@ TEST_F(ProjectTracksTest, GathersTheTracksDepthFirst)
     EXPECT_EQ(host.adapter.allTracks().size(), 6U);
 }
 
-TEST_F(ProjectTracksTest, FindsTheTracksOfAKind)
+TEST_P(ProjectTracksTest, FindsTheTracksOfAKind)
 {
     host.addTrack(TypeWord::Audio, u"FX");
     const auto folder = host.addTrack(TypeWord::Folder, u"Spots");
@@ -104,7 +141,7 @@ TEST_F(ProjectTracksTest, FindsTheTracksOfAKind)
     EXPECT_EQ(nameOf(host.adapter.tracksOfType(TypeWord::Video)), L"");
 }
 
-TEST_F(ProjectTracksTest, ARunMayChangeAllButFoldersAndRulers)
+TEST_P(ProjectTracksTest, ARunMayChangeAllButFoldersAndRulers)
 {
     const auto folder = host.addTrack(TypeWord::Folder, u"Folder");
     for (const char* word : {TypeWord::Audio, TypeWord::Video, TypeWord::Marker, TypeWord::Ruler})
@@ -113,7 +150,7 @@ TEST_F(ProjectTracksTest, ARunMayChangeAllButFoldersAndRulers)
     EXPECT_EQ(nameOf(host.adapter.cadrelTracks()), L"audio video marker ");
 }
 
-TEST_F(ProjectTracksTest, TellsWhichTracksAreThere)
+TEST_P(ProjectTracksTest, TellsWhichTracksAreThere)
 {
     const auto track = query<ITrackNode>(host.addTrack(TypeWord::Audio, u"FX"));
     EXPECT_TRUE(host.adapter.isTrackAlive(track.get()));
@@ -124,7 +161,7 @@ TEST_F(ProjectTracksTest, TellsWhichTracksAreThere)
     EXPECT_FALSE(host.adapter.isTrackAlive(nullptr));
 }
 
-TEST_F(ProjectTracksTest, TheCacheGathersTheTracksOnce)
+TEST_P(ProjectTracksTest, TheCacheGathersTheTracksOnce)
 {
     host.addTrack(TypeWord::Audio, u"FX");
     host.adapter.setUseTrackCache(true);
@@ -141,7 +178,7 @@ TEST_F(ProjectTracksTest, TheCacheGathersTheTracksOnce)
     EXPECT_EQ(host.adapter.allTracks().size(), 3U);
 }
 
-TEST_F(ProjectTracksTest, TheCacheOfAProjectWithoutTracksIsFilledOnce)
+TEST_P(ProjectTracksTest, TheCacheOfAProjectWithoutTracksIsFilledOnce)
 {
     host.adapter.setUseTrackCache(true);
     EXPECT_TRUE(host.adapter.allTracks().empty());
@@ -151,7 +188,7 @@ TEST_F(ProjectTracksTest, TheCacheOfAProjectWithoutTracksIsFilledOnce)
     EXPECT_TRUE(host.adapter.allTracks().empty());
 }
 
-TEST_F(ProjectTracksTest, TheCacheKnowsTheTracksThatTheSystemMakes)
+TEST_P(ProjectTracksTest, TheCacheKnowsTheTracksThatTheSystemMakes)
 {
     host.adapter.setUseTrackCache(true);
     host.adapter.allTracks();
@@ -162,7 +199,7 @@ TEST_F(ProjectTracksTest, TheCacheKnowsTheTracksThatTheSystemMakes)
     EXPECT_EQ(host.adapter.tracksOfType(TypeWord::Marker).size(), 7U);
 }
 
-TEST_F(ProjectTracksTest, MakesAFolderWithATrackForEachKindOfMarker)
+TEST_P(ProjectTracksTest, MakesAFolderWithATrackForEachKindOfMarker)
 {
     host.addTrack(TypeWord::Audio, u"FX");
 
@@ -187,7 +224,7 @@ TEST_F(ProjectTracksTest, MakesAFolderWithATrackForEachKindOfMarker)
     }
 }
 
-TEST_F(ProjectTracksTest, MakesTheTracksOfTheMarkersThatAreSwitchedOnAndAlwaysTheMemos)
+TEST_P(ProjectTracksTest, MakesTheTracksOfTheMarkersThatAreSwitchedOnAndAlwaysTheMemos)
 {
     core::Settings& settings = host.adapter.model().settings();
     settings.setCreateDestinationMarkers(false);
@@ -224,7 +261,7 @@ TEST_F(ProjectTracksTest, MakesTheTracksOfTheMarkersThatAreSwitchedOnAndAlwaysTh
     EXPECT_EQ(namesOf(*find(u"Cadrel Markers")).back(), u"Overlap");
 }
 
-TEST_F(ProjectTracksTest, MakesTheTracksOnce)
+TEST_P(ProjectTracksTest, MakesTheTracksOnce)
 {
     createMarkerTracks();
     const std::string once = host.dump();
@@ -234,7 +271,7 @@ TEST_F(ProjectTracksTest, MakesTheTracksOnce)
     EXPECT_EQ(host.dump(), once);
 }
 
-TEST_F(ProjectTracksTest, FindsItsTracksAgainByTheirRoles)
+TEST_P(ProjectTracksTest, FindsItsTracksAgainByTheirRoles)
 {
     createMarkerTracks();
     trackNamed(u"Insert").setName(L"What is new");
@@ -246,7 +283,7 @@ TEST_F(ProjectTracksTest, FindsItsTracksAgainByTheirRoles)
     EXPECT_EQ(host.dump(), before);
 }
 
-TEST_F(ProjectTracksTest, MakesATrackAnewThatTheUserHasRemoved)
+TEST_P(ProjectTracksTest, MakesATrackAnewThatTheUserHasRemoved)
 {
     createMarkerTracks();
     host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), find(u"Insert").get())); });
@@ -257,7 +294,7 @@ TEST_F(ProjectTracksTest, MakesATrackAnewThatTheUserHasRemoved)
     EXPECT_EQ(trackNamed(u"Insert").role(), TrackRole::Insert);
 }
 
-TEST_F(ProjectTracksTest, BringsTracksBackIntoTheFolder)
+TEST_P(ProjectTracksTest, BringsTracksBackIntoTheFolder)
 {
     createMarkerTracks();
     const auto elsewhere = host.addTrack(TypeWord::Folder, u"Elsewhere");
@@ -274,7 +311,7 @@ TEST_F(ProjectTracksTest, BringsTracksBackIntoTheFolder)
     EXPECT_EQ(namesOf(*find(u"Cadrel Markers")).size(), 7U);
 }
 
-TEST_F(ProjectTracksTest, TracksOfOthersAreLeftAlone)
+TEST_P(ProjectTracksTest, TracksOfOthersAreLeftAlone)
 {
     const auto cues = host.addTrack(TypeWord::Marker, u"Insert");
     const auto folder = host.addTrack(TypeWord::Folder, u"Cadrel Markers");
@@ -286,7 +323,7 @@ TEST_F(ProjectTracksTest, TracksOfOthersAreLeftAlone)
     EXPECT_EQ(host.adapter.tracksOfType(TypeWord::Marker).size(), 8U);
 }
 
-TEST_F(ProjectTracksTest, ATrackIsNamedInTheLanguageInWhichItWasMade)
+TEST_P(ProjectTracksTest, ATrackIsNamedInTheLanguageInWhichItWasMade)
 {
     core::Settings& settings = host.adapter.model().settings();
     settings.setCreateOverlapMarkers(false);
@@ -302,7 +339,7 @@ TEST_F(ProjectTracksTest, ATrackIsNamedInTheLanguageInWhichItWasMade)
                      u"Overlap!"}));
 }
 
-TEST_F(ProjectTracksTest, TakesTheMarkerTrackThatTheHostHasReady)
+TEST_P(ProjectTracksTest, TakesTheMarkerTrackThatTheHostHasReady)
 {
     const auto ready = makeCounted<standin::MarkerTrack>();
     const auto document = makeCounted<AlteredDocument>(host.document());
@@ -319,7 +356,7 @@ TEST_F(ProjectTracksTest, TakesTheMarkerTrackThatTheHostHasReady)
     EXPECT_EQ(project.tracksOfType(TypeWord::Marker).size(), 7U);
 }
 
-TEST_F(ProjectTracksTest, LeavesTheUsersDefaultMarkerTrackAlone)
+TEST_P(ProjectTracksTest, LeavesTheUsersDefaultMarkerTrackAlone)
 {
     host.addTrack(TypeWord::Marker, u"Cues");
     ASSERT_NE(host.document()->getDefaultMarkerTrack(), nullptr);
@@ -330,25 +367,30 @@ TEST_F(ProjectTracksTest, LeavesTheUsersDefaultMarkerTrackAlone)
     EXPECT_EQ(namesOf(*find(u"Cadrel Markers")).size(), 7U);
 }
 
-TEST_F(ProjectTracksTest, GivesEveryMemoOfTheRealProgrammeAnId)
+TEST_P(ProjectTracksTest, GivesEveryMemoOfTheRealProgrammeAnIdOfItsOwn)
 {
     createMarkerTracks();
     host.adapter.computePreviewOffset();
     const auto memos = find(u"Memos");
     const auto known = host.addPointMarker(memos, u"known", 10.0);
     const auto unknown = host.addPointMarker(memos, u"unknown", 20.0);
-    const auto inPreview = host.addPointMarker(memos, u"copy", 86400.0);
+    const auto copied = host.addPointMarker(memos, u"copied", 30.0);
+    const auto last = host.addPointMarker(memos, u"last", 86399.5 - host.origin);
+    const auto inPreview = host.addPointMarker(memos, u"copy", 86400.5 - host.origin);
     Track handle = host.handle(memos);
     HostEvent(handle, known).setUserId(4);
+    HostEvent(handle, copied).setUserId(4);
 
     createMarkerTracks();
 
     EXPECT_EQ(HostEvent(handle, known).getUserId(), 4);
     EXPECT_EQ(HostEvent(handle, unknown).getUserId(), 5);
+    EXPECT_EQ(HostEvent(handle, copied).getUserId(), 6);
+    EXPECT_EQ(HostEvent(handle, last).getUserId(), 7);
     EXPECT_EQ(HostEvent(handle, inPreview).getUserId(), -1);
 }
 
-TEST_F(ProjectTracksTest, FailsWhereTheHostMakesNoTrack)
+TEST_P(ProjectTracksTest, FailsWhereTheHostMakesNoTrack)
 {
     const auto document = makeCounted<AlteredDocument>(host.document());
     Project project(host.context(), document.get(), nullptr);
@@ -368,14 +410,14 @@ TEST_F(ProjectTracksTest, FailsWhereTheHostMakesNoTrack)
     EXPECT_EQ(project.allTracks().size(), 8U);
 }
 
-TEST_F(ProjectTracksTest, MakesNoVideoTrackWithoutNewVideos)
+TEST_P(ProjectTracksTest, MakesNoVideoTrackWithoutNewVideos)
 {
     createVideoTracks(host.adapter);
 
     EXPECT_TRUE(host.adapter.allTracks().empty());
 }
 
-TEST_F(ProjectTracksTest, MakesATrackForTheNewVideosOnce)
+TEST_P(ProjectTracksTest, MakesATrackForTheNewVideosOnce)
 {
     addVideo(host.adapter);
 
@@ -387,7 +429,7 @@ TEST_F(ProjectTracksTest, MakesATrackForTheNewVideosOnce)
     EXPECT_TRUE(trackNamed(u"New Video").isVideo());
 }
 
-TEST_F(ProjectTracksTest, TheSecondVideoTrackIsThatOfTheNewPicture)
+TEST_P(ProjectTracksTest, TheSecondVideoTrackIsThatOfTheNewPicture)
 {
     VideoProvider provider(host.context());
     Project project(host.context(), host.document(), &provider);
@@ -405,7 +447,7 @@ TEST_F(ProjectTracksTest, TheSecondVideoTrackIsThatOfTheNewPicture)
     provider.setProject(nullptr);
 }
 
-TEST_F(ProjectTracksTest, ATrackOfTheUsersOwnVideoCountsAsThatOfTheNewPicture)
+TEST_P(ProjectTracksTest, ATrackOfTheUsersOwnVideoCountsAsThatOfTheNewPicture)
 {
     addVideo(host.adapter);
     const auto own = host.addTrack(TypeWord::Video, u"Temp VFX");
@@ -416,7 +458,7 @@ TEST_F(ProjectTracksTest, ATrackOfTheUsersOwnVideoCountsAsThatOfTheNewPicture)
     EXPECT_EQ(namesOf(*host.root()), Names{u"Temp VFX"});
 }
 
-TEST_F(ProjectTracksTest, LocksWhatARunWouldChangeAndItsOwnTracksButTheMemos)
+TEST_P(ProjectTracksTest, LocksWhatARunWouldChangeAndItsOwnTracksButTheMemos)
 {
     const auto fx = host.addTrack(TypeWord::Audio, u"FX");
     const auto music = host.addTrack(TypeWord::Audio, u"Music");
@@ -443,7 +485,7 @@ TEST_F(ProjectTracksTest, LocksWhatARunWouldChangeAndItsOwnTracksButTheMemos)
     }
 }
 
-TEST_F(ProjectTracksTest, LeavesTracksAloneThatTheUserHasLocked)
+TEST_P(ProjectTracksTest, LeavesTracksAloneThatTheUserHasLocked)
 {
     const auto fx = host.addTrack(TypeWord::Audio, u"FX");
     requireOk(query<ITrackNode>(fx)->setFlag(TrackFlag::Lock, true));
@@ -456,7 +498,7 @@ TEST_F(ProjectTracksTest, LeavesTracksAloneThatTheUserHasLocked)
     EXPECT_TRUE(host.handle(fx).hostLocked());
 }
 
-TEST_F(ProjectTracksTest, LocksOnlySelectedTracksWhereARunChangesOnlyThose)
+TEST_P(ProjectTracksTest, LocksOnlySelectedTracksWhereARunChangesOnlyThose)
 {
     host.adapter.model().settings().setApplyTo(core::ApplyTo::SelectedTracks);
     const auto fx = host.addTrack(TypeWord::Audio, u"FX");
@@ -470,7 +512,7 @@ TEST_F(ProjectTracksTest, LocksOnlySelectedTracksWhereARunChangesOnlyThose)
     EXPECT_TRUE(host.handle(music).hostLocked());
 }
 
-TEST_F(ProjectTracksTest, CollectsTheTracksAnewEachTime)
+TEST_P(ProjectTracksTest, CollectsTheTracksAnewEachTime)
 {
     const auto fx = host.addTrack(TypeWord::Audio, u"FX");
     host.adapter.collectLockTracks();
@@ -482,7 +524,7 @@ TEST_F(ProjectTracksTest, CollectsTheTracksAnewEachTime)
     EXPECT_TRUE(host.handle(fx).hostLocked());
 }
 
-TEST_F(ProjectTracksTest, ForgetsTheTracksThatItReleases)
+TEST_P(ProjectTracksTest, ForgetsTheTracksThatItReleases)
 {
     const auto fx = host.addTrack(TypeWord::Audio, u"FX");
     host.adapter.collectLockTracks();
@@ -493,7 +535,7 @@ TEST_F(ProjectTracksTest, ForgetsTheTracksThatItReleases)
     EXPECT_FALSE(host.handle(fx).hostLocked());
 }
 
-TEST_F(ProjectTracksTest, FindsItsOwnTracksBeforeItLocksThem)
+TEST_P(ProjectTracksTest, FindsItsOwnTracksBeforeItLocksThem)
 {
     addVideo(host.adapter);
     createVideoTracks(host.adapter);
@@ -507,7 +549,7 @@ TEST_F(ProjectTracksTest, FindsItsOwnTracksBeforeItLocksThem)
     EXPECT_FALSE(trackNamed(u"Memos").hostLocked());
 }
 
-TEST_F(ProjectTracksTest, AMissingTrackDoesNotKeepTheOthersFromBeingUnlocked)
+TEST_P(ProjectTracksTest, AMissingTrackDoesNotKeepTheOthersFromBeingUnlocked)
 {
     const auto fx = host.addTrack(TypeWord::Audio, u"FX");
     const auto music = host.addTrack(TypeWord::Audio, u"Music");
@@ -518,6 +560,51 @@ TEST_F(ProjectTracksTest, AMissingTrackDoesNotKeepTheOthersFromBeingUnlocked)
     host.adapter.setTracksLocked(false);
 
     EXPECT_FALSE(host.handle(music).hostLocked());
+}
+
+TEST_P(ProjectTracksTest, ATrackThatRefusesDoesNotKeepTheOthersFromBeingLocked)
+{
+    const std::set<std::string> audio{TypeWord::Track, TypeWord::Audio};
+    const auto first = makeCounted<LockTrack>(audio, 0);
+    const auto refusing = makeCounted<LockTrack>(audio, 0);
+    const auto last = makeCounted<LockTrack>(audio, 0);
+    const auto document = makeCounted<FakeProject>(GetParam());
+    document->children = {first, refusing, last};
+    Project project(host.context(), document.get(), nullptr);
+    project.collectLockTracks();
+    refusing->setterResult = ResultFalse;
+
+    EXPECT_EQ(thrownBy([&] { project.setTracksLocked(true); }), Result::HostCallFailed);
+    EXPECT_TRUE(first->isLocked);
+    EXPECT_FALSE(refusing->isLocked);
+    EXPECT_TRUE(last->isLocked);
+
+    EXPECT_EQ(thrownBy([&] { project.setTracksLocked(false); }), Result::HostCallFailed);
+    EXPECT_FALSE(first->isLocked);
+    EXPECT_FALSE(last->isLocked);
+}
+
+TEST_P(ProjectTracksTest, AMarkerTrackThatCannotBeReadDoesNotKeepThePictureFromBeingLocked)
+{
+    // It says that it is one of markers, and not that it is a track.
+    const auto unreadable = makeCounted<LockTrack>(std::set<std::string>{TypeWord::Marker}, 0);
+    const auto video =
+        makeCounted<LockTrack>(std::set<std::string>{TypeWord::Track, TypeWord::Video}, TrackRole::NewVideo);
+    const auto document = makeCounted<FakeProject>(GetParam());
+    document->children = {unreadable, video};
+    Project project(host.context(), document.get(), nullptr);
+
+    EXPECT_EQ(thrownBy([&] { project.setTracksLocked(true); }), Result::NotSupported);
+
+    EXPECT_TRUE(video->isLocked);
+}
+
+TEST_P(ProjectTracksTest, AllTracksHaveToBeUsableAsSuch)
+{
+    const auto document = FakeProject::withoutUsableTrack();
+    Project project(host.context(), document.get(), nullptr);
+
+    EXPECT_EQ(thrownBy([&] { project.allTracks(); }), Result::HostObjectMissing);
 }
 
 } // namespace cadrel::host

@@ -146,6 +146,7 @@ TEST_P(TrackEventsTest, AReversedRangeIsRefused)
 {
     EXPECT_EQ(resultOf([&] { fx.eventsInRange(2.0, 1.0); }), Result::InvalidArgument);
     EXPECT_EQ(resultOf([&] { fx.assignIds(2.0, 1.0); }), Result::InvalidArgument);
+    EXPECT_EQ(resultOf([&] { fx.assignOwnIds(2.0, 1.0); }), Result::InvalidArgument);
     EXPECT_EQ(resultOf([&] { fx.removeRange(*host.transaction(), clock(2.0), clock(1.0)); }), Result::InvalidArgument);
 }
 
@@ -298,6 +299,7 @@ TEST_P(TrackEventsTest, ThereIsNoUserIdBehindTheHighestOfAll)
 
     EXPECT_EQ(resultOf([&] { memos.nextUserId(); }), Result::OutOfRange);
     EXPECT_EQ(resultOf([&] { memos.assignIds(0.0, 10.0); }), Result::OutOfRange);
+    EXPECT_EQ(resultOf([&] { memos.assignOwnIds(0.0, 10.0); }), Result::OutOfRange);
 }
 
 TEST_P(TrackEventsTest, GivesIdsToThoseInTheRangeThatHaveNone)
@@ -318,6 +320,50 @@ TEST_P(TrackEventsTest, GivesIdsToThoseInTheRangeThatHaveNone)
     memos.assignIds(0.0, 20.0);
     EXPECT_EQ(idOf(outside), 7);
     EXPECT_EQ(idOf(first), 5);
+}
+
+TEST_P(TrackEventsTest, GivesEachInTheRangeAnIdOfItsOwn)
+{
+    const auto withId = [&](double start, std::int64_t id) {
+        const auto memo = host.addPointMarker(memoNode, u"memo", start);
+        HostEvent(memos, memo).setUserId(id);
+        return memo;
+    };
+    const auto before = withId(9.0, 4);
+    const auto none = host.addPointMarker(memoNode, u"none", 10.0);
+    const auto first = withId(11.0, 4);
+    const auto zero = withId(12.0, 0);
+    const auto second = withId(13.0, 4);
+    const auto other = withId(14.0, 6);
+    const auto third = withId(15.0, 4);
+    const auto atEnd = withId(20.0, 4);
+
+    memos.assignOwnIds(10.0, 20.0);
+
+    EXPECT_EQ(idOf(before), 4);
+    EXPECT_EQ(idOf(none), 7);
+    EXPECT_EQ(idOf(first), 4);
+    EXPECT_EQ(idOf(zero), 8);
+    EXPECT_EQ(idOf(second), 9);
+    EXPECT_EQ(idOf(other), 6);
+    EXPECT_EQ(idOf(third), 10);
+    EXPECT_EQ(idOf(atEnd), 4) << "A range doesn't hold its end.";
+
+    memos.assignOwnIds(10.0, 20.0);
+    EXPECT_EQ(idOf(none), 7);
+    EXPECT_EQ(idOf(third), 10);
+}
+
+TEST_P(TrackEventsTest, AMemoWithoutIdCannotTakeThatOfALaterOne)
+{
+    const auto none = host.addPointMarker(memoNode, u"none", 10.0);
+    const auto known = host.addPointMarker(memoNode, u"known", 11.0);
+    HostEvent(memos, known).setUserId(1);
+
+    memos.assignOwnIds(0.0, 20.0);
+
+    EXPECT_EQ(idOf(none), 2);
+    EXPECT_EQ(idOf(known), 1);
 }
 
 TEST_P(TrackEventsTest, RemovesAllThatStandsOnTheTrack)

@@ -89,6 +89,7 @@ TEST_P(TrackTest, AnEmptyHandleChangesNothing)
     EXPECT_EQ(resultOf([&] { track.container(); }), Result::NotAvailable);
     EXPECT_EQ(resultOf([&] { track.readIndex(); }), Result::HostObjectMissing);
     EXPECT_EQ(resultOf([&] { track.assignIds(0.0, 100.0); }), Result::Ok);
+    EXPECT_EQ(resultOf([&] { track.assignOwnIds(0.0, 100.0); }), Result::Ok);
     EXPECT_EQ(resultOf([&] { track.fillAutomationGap(*host.transaction(), noCurves, 0.0, 1.0); }), Result::Ok);
 }
 
