@@ -14,7 +14,6 @@
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
-#include <optional>
 #include <sched.h>
 #include <set>
 #include <string>
@@ -98,27 +97,24 @@ TEST_F(ProjectFileSaving, PutsTheNewFileInThePlaceOfTheFormer)
 TEST_F(ProjectFileSaving, LeavesOneWholeFileWhereverItIsKilled)
 {
     std::set<std::string> found;
-    std::optional<int> status;
-    for (int step = 1; !status; ++step) {
+    ChildProcess::Progress progress;
+    for (int step = 1; !progress.status; ++step) {
         putFormerFile();
 
-        status = ChildProcess::statusUnlessKilledAt(step, [&] {
-            save();
-            return 0;
-        });
+        progress = ChildProcess::runUnlessKilledAt(step, [&] { return save(), 0; });
 
         const std::string left = content();
-        EXPECT_TRUE(left == formerText || left == newText) << "killed at step " << step;
+        EXPECT_TRUE(left == (progress.hasRenamed ? newText : formerText)) << "killed at step " << step;
         found.insert(left);
     }
 
-    EXPECT_EQ(status, 0);
+    EXPECT_EQ(progress.status, 0);
     EXPECT_EQ(found, (std::set<std::string>{formerText, newText}));
 }
 
 TEST_F(ProjectFileSaving, SucceedsAmongWhatEarlierOnesLeftBehindWhenTheyWereKilled)
 {
-    for (int step = 1; !ChildProcess::statusUnlessKilledAt(step, [&] { return save(), 0; }); ++step)
+    for (int step = 1; !ChildProcess::runUnlessKilledAt(step, [&] { return save(), 0; }).status; ++step)
         putFormerFile();
     ASSERT_GT(folder().names().size(), 1U);
     putFormerFile();

@@ -3,6 +3,7 @@
 #include <cerrno>
 #include <csignal>
 #include <cstddef>
+#include <cstdint>
 #include <linux/filter.h>
 #include <linux/seccomp.h>
 #include <optional>
@@ -53,23 +54,41 @@ public:
         return child.status();
     }
 
+    /// How far a process came.
+    struct Progress {
+        std::optional<int> status; ///< nothing when it was killed
+        bool hasRenamed = false;   ///< a file, with success
+    };
+
     /// Kills it, as a failing machine would, at its `step`-th crossing of the border to the system: at the
-    /// odd ones a call is about to be made, at the even ones it has just been made. Nothing when it was killed.
+    /// odd ones a call is about to be made, at the even ones it has just been made.
     template <class Action>
-    static std::optional<int> statusUnlessKilledAt(int step, Action action)
+    static Progress runUnlessKilledAt(int step, Action action)
     {
+        Progress progress;
         ChildProcess child(action, true);
         child.wait();
+        // Or the system doesn't tell a call from a signal.
+        ptrace(PTRACE_SETOPTIONS, child.id_, nullptr, PTRACE_O_TRACESYSGOOD);
+        bool isRenaming = false;
         for (int crossing = 1; child.isRunning(); ++crossing) {
             ptrace(PTRACE_SYSCALL, child.id_, nullptr, nullptr);
             child.wait();
-            if (child.isRunning() && crossing == step) {
+            if (!child.isRunning())
+                break;
+            const __ptrace_syscall_info call = child.currentCall();
+            if (call.op == PTRACE_SYSCALL_INFO_ENTRY)
+                isRenaming = isRenameCall(call.entry.nr);
+            else if (call.op == PTRACE_SYSCALL_INFO_EXIT)
+                progress.hasRenamed = progress.hasRenamed || (isRenaming && !call.exit.is_error);
+            if (crossing == step) {
                 kill(child.id_, SIGKILL);
                 child.wait();
-                return std::nullopt;
+                return progress;
             }
         }
-        return child.status();
+        progress.status = child.status();
+        return progress;
     }
 
 private:
@@ -90,13 +109,37 @@ private:
         }
     }
 
+    static bool isRenameCall(std::uint64_t number)
+    {
+#ifdef SYS_rename
+        if (number == SYS_rename) // newer kinds of machine have it no more
+            return true;
+#endif
+        return number == SYS_renameat || number == SYS_renameat2;
+    }
+
+    /// The one at whose border it stands.
+    __ptrace_syscall_info currentCall() const
+    {
+        __ptrace_syscall_info call{};
+        if (ptrace(PTRACE_GET_SYSCALL_INFO, id_, sizeof call, &call) <= 0)
+            throw std::runtime_error("the system doesn't tell what a process calls");
+        return call;
+    }
+
     void wait()
     {
         if (waitpid(id_, &state_, 0) != id_)
             throw std::runtime_error("a process has gone astray");
     }
-    bool isRunning() const { return WIFSTOPPED(state_); }
-    int status() const { return WIFEXITED(state_) ? WEXITSTATUS(state_) : -1; }
+    bool isRunning() const
+    {
+        return WIFSTOPPED(state_);
+    }
+    int status() const
+    {
+        return WIFEXITED(state_) ? WEXITSTATUS(state_) : -1;
+    }
 
     pid_t id_;
     int state_ = 0x7f; // stopped, as far as is known
