@@ -13,6 +13,8 @@ namespace cadrel::app {
 class JsonOutput {
 public:
     static bool isStandardOutput(const std::string& path) { return path == "-"; }
+    /// Whether it is asked for, and in a file.
+    static bool isFile(const std::string& path) { return !path.empty() && !isStandardOutput(path); }
 
     explicit JsonOutput(const std::string& path);
 

@@ -39,11 +39,6 @@ using core::Timecode;
 
 namespace {
 
-bool writesJsonFile(const ApplyOptions& options)
-{
-    return !options.jsonFile.empty() && !JsonOutput::isStandardOutput(options.jsonFile);
-}
-
 /// The project file to write; empty for none.
 const std::string& targetOf(const ApplyOptions& options)
 {
@@ -66,7 +61,7 @@ void checkOutputs(const ApplyOptions& options)
         taken.push_back(options.outputFile);
     }
     taken.push_back(options.projectFile);
-    if (writesJsonFile(options))
+    if (JsonOutput::isFile(options.jsonFile))
         refuseToOverwrite(taken, options.jsonFile);
 }
 
@@ -204,7 +199,7 @@ ApplyFacts factsOf(HostedProject& hosted, const ChangeSource& source, const Appl
     facts.changeNames = source.fileNames;
     facts.passedOver = passedOver(model, clockOf(hosted.project(), options.projectFile).rateLabel(), options);
     facts.written = targetOf(options);
-    facts.jsonFile = writesJsonFile(options) ? options.jsonFile : std::string();
+    facts.jsonFile = JsonOutput::isFile(options.jsonFile) ? options.jsonFile : std::string();
     return facts;
 }
 

@@ -31,16 +31,11 @@ using util::StringUtil;
 
 namespace {
 
-bool writesJsonFile(const GenerateOptions& options)
-{
-    return !options.jsonFile.empty() && !JsonOutput::isStandardOutput(options.jsonFile);
-}
-
 /// Throws UsageError when one of the change EDL's files, or the JSON file, would overwrite another file of this run.
 void checkOutputs(const GenerateOptions& options, const std::vector<std::string>& changeFiles)
 {
     std::vector<std::string> taken = inputsOf(options.generation);
-    if (writesJsonFile(options)) {
+    if (JsonOutput::isFile(options.jsonFile)) {
         refuseToOverwrite(taken, options.jsonFile);
         taken.push_back(options.jsonFile);
     }
@@ -72,7 +67,7 @@ void saveChangeEdl(const EventList& changeEvents, const std::string& path, const
 
 std::string writtenText(const GenerateOptions& options, std::vector<std::string> written)
 {
-    if (writesJsonFile(options))
+    if (JsonOutput::isFile(options.jsonFile))
         written.push_back(options.jsonFile);
     return "Written     " + (written.empty() ? "nothing; give -o CHANGE.edl" : toPrintable(joined(written)).text) +
            "\n";
@@ -99,7 +94,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
 
     terminal.showProgress("writing");
     std::optional<Interruption> interruption;
-    if (!changeFiles.empty() || writesJsonFile(options))
+    if (!changeFiles.empty() || JsonOutput::isFile(options.jsonFile))
         interruption.emplace();
     std::optional<JsonOutput> json;
     if (!options.jsonFile.empty()) {
