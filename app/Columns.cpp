@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/Columns.h"
 
 #include <algorithm>
@@ -17,27 +19,27 @@ std::size_t widthOf(std::string_view utf8)
 } // namespace
 
 Columns::Columns(const Row& titles, const std::vector<std::size_t>& rightAligned)
-    : titles_(titles), columns_(titles.size())
+    : m_titles(titles), m_columns(titles.size())
 {
     for (const std::size_t index : rightAligned)
-        columns_[index].alignsRight = true;
-    measure(titles_);
+        m_columns[index].alignsRight = true;
+    measure(m_titles);
 }
 
 void Columns::measure(const Row& row)
 {
-    for (std::size_t index = 0; index < columns_.size(); ++index)
-        columns_[index].width = std::max(columns_[index].width, widthOf(row[index]));
+    for (std::size_t index = 0; index < m_columns.size(); ++index)
+        m_columns[index].width = std::max(m_columns[index].width, widthOf(row[index]));
 }
 
 std::string Columns::lineOf(const Row& row) const
 {
     std::string line;
-    for (std::size_t index = 0; index < columns_.size(); ++index) {
+    for (std::size_t index = 0; index < m_columns.size(); ++index) {
         const std::size_t width = widthOf(row[index]);
-        const std::string fill(std::max(columns_[index].width, width) - width, ' ');
+        const std::string fill(std::max(m_columns[index].width, width) - width, ' ');
         line += index == 0 ? "" : "  ";
-        line += columns_[index].alignsRight ? fill + row[index] : row[index] + fill;
+        line += m_columns[index].alignsRight ? fill + row[index] : row[index] + fill;
     }
     line.erase(line.find_last_not_of(' ') + 1);
     return line;

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <cstddef>
@@ -18,7 +20,7 @@ public:
     void measure(const Row& row);
     /// Without blanks at its end.
     std::string lineOf(const Row& row) const;
-    std::string titleLine() const { return lineOf(titles_); }
+    std::string titleLine() const { return lineOf(m_titles); }
 
 private:
     struct Column {
@@ -26,8 +28,8 @@ private:
         bool alignsRight = false;
     };
 
-    Row titles_;
-    std::vector<Column> columns_;
+    Row m_titles;
+    std::vector<Column> m_columns;
 };
 
 } // namespace cadrel::app

@@ -1,9 +1,11 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/CommandLine.h"
 
 #include "app/Failure.h"
 #include "app/JsonOutput.h"
 #include "app/edl/ProjectFramerate.h"
-#include "core/Settings.h"
+#include "core/settings/Settings.h"
 
 #include <CLI/CLI.hpp>
 #include <algorithm>

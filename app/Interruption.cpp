@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/Interruption.h"
 
 namespace cadrel::app {
@@ -28,16 +30,16 @@ void waitFor(int signal, struct sigaction& former)
 Interruption::Interruption()
 {
     requested = 0;
-    waitFor(SIGINT, formerInterrupt_);
-    waitFor(SIGTERM, formerTerminate_);
-    waitFor(SIGHUP, formerHangUp_);
+    waitFor(SIGINT, m_formerInterrupt);
+    waitFor(SIGTERM, m_formerTerminate);
+    waitFor(SIGHUP, m_formerHangUp);
 }
 
 Interruption::~Interruption()
 {
-    sigaction(SIGINT, &formerInterrupt_, nullptr);
-    sigaction(SIGTERM, &formerTerminate_, nullptr);
-    sigaction(SIGHUP, &formerHangUp_, nullptr);
+    sigaction(SIGINT, &m_formerInterrupt, nullptr);
+    sigaction(SIGTERM, &m_formerTerminate, nullptr);
+    sigaction(SIGHUP, &m_formerHangUp, nullptr);
     if (requested != 0)
         std::raise(requested);
 }

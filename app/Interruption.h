@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <csignal>
@@ -22,9 +24,9 @@ public:
     static void check();
 
 private:
-    struct sigaction formerInterrupt_ {};
-    struct sigaction formerTerminate_ {};
-    struct sigaction formerHangUp_ {};
+    struct sigaction m_formerInterrupt {};
+    struct sigaction m_formerTerminate {};
+    struct sigaction m_formerHangUp {};
 };
 
 } // namespace cadrel::app

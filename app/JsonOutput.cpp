@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/JsonOutput.h"
 
 #include "app/Failure.h"
@@ -12,12 +14,12 @@ namespace cadrel::app {
 
 using util::Result;
 
-JsonOutput::JsonOutput(const std::string& path) : path_(path)
+JsonOutput::JsonOutput(const std::string& path) : m_path(path)
 {
     if (isStandardOutput(path))
         return;
     const auto target = util::toFilePath(toWide(path));
-    orUnwritable([&] { file_.emplace(target); });
+    orUnwritable([&] { m_file.emplace(target); });
 }
 
 /// Does what fails when the file can't be written.
@@ -27,31 +29,31 @@ void JsonOutput::orUnwritable(Action action)
     try {
         action();
     } catch (const Result::Type&) {
-        throw unwritable({path_});
+        throw unwritable({m_path});
     }
 }
 
 void JsonOutput::write(std::string_view text)
 {
     Interruption::check();
-    if (file_)
-        orUnwritable([&] { file_->write(text); });
+    if (m_file)
+        orUnwritable([&] { m_file->write(text); });
     else
         std::cout << text;
 }
 
 void JsonOutput::finish()
 {
-    if (file_)
-        orUnwritable([&] { file_->putInPlace(); });
+    if (m_file)
+        orUnwritable([&] { m_file->putInPlace(); });
     else
         flushStandardOutput();
 }
 
 void JsonOutput::keep()
 {
-    if (file_)
-        file_->keep();
+    if (m_file)
+        m_file->keep();
 }
 
 void flushStandardOutput()

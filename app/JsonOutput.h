@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "util/FileReplacement.h"
@@ -27,8 +29,8 @@ private:
     template <class Action>
     void orUnwritable(Action action);
 
-    std::string path_;
-    std::optional<util::FileReplacement> file_; ///< nothing for standard output
+    std::string m_path;
+    std::optional<util::FileReplacement> m_file; ///< nothing for standard output
 };
 
 /// Throws Failure when something that was given to standard output has not been taken.

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/Terminal.h"
 
 #include "app/Printable.h"
@@ -24,7 +26,7 @@ std::string environment(const char* name)
 
 } // namespace
 
-Terminal::Terminal() : showsProgress_(isatty(STDERR_FILENO) == 1 && environment("TERM") != "dumb") {}
+Terminal::Terminal() : m_showsProgress(isatty(STDERR_FILENO) == 1 && environment("TERM") != "dumb") {}
 
 Terminal::~Terminal()
 {
@@ -33,25 +35,25 @@ Terminal::~Terminal()
 
 void Terminal::showProgress(const std::string& what)
 {
-    if (showsProgress_) {
+    if (m_showsProgress) {
         clearProgress();
         std::cerr << toPrintable(what, 70).text << std::flush;
-        progressShown_ = true;
+        m_progressShown = true;
     }
 }
 
 void Terminal::clearProgress()
 {
-    if (progressShown_) {
+    if (m_progressShown) {
         std::cerr << "\r\033[K" << std::flush;
-        progressShown_ = false;
+        m_progressShown = false;
     }
 }
 
 void Terminal::warn(const Failure& failure)
 {
     const std::string warning = toPrintable(failure.file).text + ": warning: " + sentence(failure);
-    if (warnings_.insert(warning).second)
+    if (m_warnings.insert(warning).second)
         writeLine(warning);
 }
 

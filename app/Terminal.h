@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "app/Failure.h"
@@ -16,7 +18,7 @@ public:
     ~Terminal();
 
     /// Whether there is one to show it on.
-    bool showsProgress() const { return showsProgress_; }
+    bool showsProgress() const { return m_showsProgress; }
     /// Shows what is being done, on a terminal only.
     void showProgress(const std::string& what);
     void clearProgress();
@@ -32,9 +34,9 @@ public:
 private:
     void writeLine(const std::string& text);
 
-    bool showsProgress_;
-    bool progressShown_ = false;
-    std::set<std::string> warnings_;
+    bool m_showsProgress;
+    bool m_progressShown = false;
+    std::set<std::string> m_warnings;
 };
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // `cadrel`: carries a sound project over to a new picture cut. This file knows the exit status; the command line and the
 // commands stand beside it.
 

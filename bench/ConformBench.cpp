@@ -1,14 +1,16 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What it takes to conform the tracks of a film: a whole run, and its stages one by one.
 
-#include "core/AutomationWarningDetectAlgorithm.h"
-#include "core/Cut.h"
-#include "core/CutList.h"
-#include "core/InsertDetectAlgorithm.h"
-#include "core/OverlapDetectAlgorithm.h"
-#include "core/RemainsDetectAlgorithm.h"
-#include "core/SnippetAlgorithm.h"
-#include "core/TransitionDetectAlgorithm.h"
-#include "tests/core/ConformFilm.h"
+#include "core/conform/SnippetAlgorithm.h"
+#include "core/cut/Cut.h"
+#include "core/cut/CutList.h"
+#include "core/detect/AutomationWarningDetectAlgorithm.h"
+#include "core/detect/InsertDetectAlgorithm.h"
+#include "core/detect/OverlapDetectAlgorithm.h"
+#include "core/detect/RemainsDetectAlgorithm.h"
+#include "core/detect/TransitionDetectAlgorithm.h"
+#include "tests/core/conform/ConformFilm.h"
 
 #include <benchmark/benchmark.h>
 

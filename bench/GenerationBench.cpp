@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What it takes to generate and heal a change EDL.
 
 #include "bench/BenchEdls.h"
-#include "core/DataModel.h"
-#include "core/EventBase.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
 #include "tests/core/TestProject.h"
 #include "tests/util/TempFolder.h"
 

@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Measures whole runs on the tracks of a host against the bounds that they have to keep; fails when a bound is missed.
 
-#include "core/DataModel.h"
-#include "core/EventBase.h"
-#include "core/Timecode.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
+#include "core/time/Timecode.h"
 #include "host/Host.h"
 #include "standin/Application.h"
 #include "standin/ProjectManager.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Measures the whole program, from start to exit, against the bounds that it has to keep. Takes the path of `cadrel` and
 // a folder for its files; fails when a bound is missed.
 

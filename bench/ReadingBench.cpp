@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What it takes to read and to write a list.
 
 #include "bench/BenchEdls.h"
-#include "core/EventBase.h"
-#include "core/EventList.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
 #include "tests/core/TestProject.h"
 #include "tests/util/TempFolder.h"
@@ -18,14 +20,14 @@ class WrittenEdl {
 public:
     explicit WrittenEdl(const benchmark::State& state)
     {
-        writeEdl(folder_ / "big.edl", makeCut(static_cast<std::size_t>(state.range(0))));
+        writeEdl(m_folder / "big.edl", makeCut(static_cast<std::size_t>(state.range(0))));
     }
 
-    std::wstring path() const { return tests::widePath(folder_ / "big.edl"); }
+    std::wstring path() const { return tests::widePath(m_folder / "big.edl"); }
 
 private:
-    tests::TestProject project_{core::Framerate(24, 0)};
-    tests::TempFolder folder_;
+    tests::TestProject m_project{core::Framerate(24, 0)};
+    tests::TempFolder m_folder;
 };
 
 void Detect(benchmark::State& state)

@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // The archive reading a data model of any version from any bytes.
 
-#include "core/DataModel.h"
-#include "core/EventBase.h"
-#include "core/HealedEvent.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/HealedEvent.h"
+#include "core/model/DataModel.h"
 #include "core/serialize/ByteArchive.h"
 #include "fuzz/Check.h"
 #include "tests/core/TestProject.h"

@@ -1,11 +1,13 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Two EDLs into a change EDL.
 //
 // An input is readable text: a line of five digits, which choose the names to match by, the heal mode, the VFX pattern,
 // the frame rate and the heal mode of a second healing; the old EDL; a line "===="; the new EDL.
 
-#include "core/DataModel.h"
-#include "core/EventBase.h"
-#include "core/HealedEvent.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/HealedEvent.h"
+#include "core/model/DataModel.h"
 #include "core/serialize/ByteArchive.h"
 #include "fuzz/Check.h"
 #include "tests/core/TestProject.h"

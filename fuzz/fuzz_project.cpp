@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // The reader of project files on any bytes, and the writer on what it has read.
 
 #include "fuzz/Check.h"

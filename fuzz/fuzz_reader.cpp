@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // The CMX reader on any bytes, and the writer on what it has read.
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
 #include "core/fileio/CmxWriter.h"
 #include "fuzz/Check.h"

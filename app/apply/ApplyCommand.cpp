@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/apply/ApplyCommand.h"
 
 #include "app/Failure.h"
@@ -15,9 +17,9 @@
 #include "app/edl/EventJson.h"
 #include "app/project/ProjectAccess.h"
 #include "app/project/ProjectClock.h"
-#include "core/DataModel.h"
-#include "core/EventBase.h"
-#include "core/Timecode.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
+#include "core/time/Timecode.h"
 #include "standin/project/Project.h"
 
 #include <algorithm>

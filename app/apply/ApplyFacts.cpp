@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/apply/ApplyFacts.h"
 
-#include "core/DataModel.h"
-#include "host/TrackRole.h"
+#include "core/model/DataModel.h"
+#include "host/track/TrackRole.h"
 #include "velmark/Attributes.h"
 
 #include <algorithm>

@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/apply/ApplyJson.h"
 
-#include "core/DataModel.h"
-#include "core/EventBase.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
 #include "standin/file/Utf16.h"
 
 #include <utility>
@@ -28,19 +30,19 @@ ordered_json describe(const Placement& placement)
 
 ordered_json ApplyJson::toJson() const
 {
-    const core::EventList& changes = facts_.model.changeEdl();
+    const core::EventList& changes = m_facts.model.changeEdl();
     ordered_json passedOver = ordered_json::array();
-    for (const PassedOver& passed : facts_.passedOver)
+    for (const PassedOver& passed : m_facts.passedOver)
         passedOver.push_back({{"number", passed.event->eventNumber()},
                               {"dstIn", passed.event->dstIn().toString()},
                               {"dstOut", passed.event->dstOut().toString()},
                               {"roll", passed.event->rollName()},
                               {"reason", passed.reason}});
     ordered_json tracks = ordered_json::array();
-    for (const TrackComparison* const track : facts_.userTracks())
+    for (const TrackComparison* const track : m_facts.userTracks())
         tracks.push_back(toJson(*track));
     ordered_json markers = ordered_json::array();
-    for (const TrackComparison* const track : facts_.markedTracks()) {
+    for (const TrackComparison* const track : m_facts.markedTracks()) {
         for (const Placement& marker : track->added) {
             ordered_json facts{{"kind", toUtf8(track->track->name())}, {"name", toUtf8(marker.name)}};
             facts.update(span(marker.start, marker.end));
@@ -48,17 +50,17 @@ ordered_json ApplyJson::toJson() const
         }
     }
 
-    ordered_json json{{"project", facts_.projectName}, {"rate", clock_.rateLabel()}};
-    if (facts_.generation)
-        json.update(facts_.generation->toJson());
+    ordered_json json{{"project", m_facts.projectName}, {"rate", m_clock.rateLabel()}};
+    if (m_facts.generation)
+        json.update(m_facts.generation->toJson());
     else
-        json["change"] = {{"files", facts_.changeNames}, {"invalid", changes.countInvalid()}};
-    json["applied"] = facts_.appliedCount();
+        json["change"] = {{"files", m_facts.changeNames}, {"invalid", changes.countInvalid()}};
+    json["applied"] = m_facts.appliedCount();
     json["passedOver"] = std::move(passedOver);
-    json["seconds"] = facts_.seconds;
+    json["seconds"] = m_facts.seconds;
     json["tracks"] = std::move(tracks);
     json["markers"] = std::move(markers);
-    json["written"] = facts_.written.empty() ? ordered_json() : ordered_json(facts_.written);
+    json["written"] = m_facts.written.empty() ? ordered_json() : ordered_json(m_facts.written);
     return json;
 }
 
@@ -116,14 +118,14 @@ ordered_json ApplyJson::toJson(const TrackComparison& track) const
 ordered_json ApplyJson::span(double start, double end) const
 {
     const auto time = [this](double seconds) {
-        return ordered_json{{"seconds", seconds}, {"timecode", clock_.timecode(seconds)}};
+        return ordered_json{{"seconds", seconds}, {"timecode", m_clock.timecode(seconds)}};
     };
     return {{"in", time(start)}, {"out", time(end)}};
 }
 
 ordered_json ApplyJson::length(double seconds) const
 {
-    return {{"seconds", seconds}, {"timecode", clock_.length(seconds)}};
+    return {{"seconds", seconds}, {"timecode", m_clock.length(seconds)}};
 }
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "app/apply/ApplyFacts.h"
@@ -13,7 +15,7 @@ namespace cadrel::app {
 class ApplyJson {
 public:
     /// Both outlive this.
-    ApplyJson(const ApplyFacts& facts, const ProjectClock& clock) : facts_(facts), clock_(clock) {}
+    ApplyJson(const ApplyFacts& facts, const ProjectClock& clock) : m_facts(facts), m_clock(clock) {}
 
     nlohmann::ordered_json toJson() const;
 
@@ -23,8 +25,8 @@ private:
     nlohmann::ordered_json span(double start, double end) const;
     nlohmann::ordered_json length(double seconds) const;
 
-    const ApplyFacts& facts_;
-    const ProjectClock& clock_;
+    const ApplyFacts& m_facts;
+    const ProjectClock& m_clock;
 };
 
 } // namespace cadrel::app

@@ -1,11 +1,13 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/apply/ApplyListing.h"
 
 #include "app/Columns.h"
 #include "app/Printable.h"
 #include "app/Wording.h"
-#include "core/DataModel.h"
-#include "core/EventBase.h"
-#include "core/Settings.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
+#include "core/settings/Settings.h"
 
 #include <algorithm>
 #include <array>
@@ -175,18 +177,18 @@ std::string eventText(const core::EventBase& event)
 
 void ApplyListing::printTotals(std::ostream& out) const
 {
-    const core::DataModel& model = facts_.model;
-    const std::string rate = clock_.rateInWords() + ", as the project has it";
-    out << "Project     " << toPrintable(facts_.projectName).text << '\n';
-    if (facts_.generation)
-        out << facts_.generation->cutsText(rate) << facts_.generation->changeText();
+    const core::DataModel& model = m_facts.model;
+    const std::string rate = m_clock.rateInWords() + ", as the project has it";
+    out << "Project     " << toPrintable(m_facts.projectName).text << '\n';
+    if (m_facts.generation)
+        out << m_facts.generation->cutsText(rate) << m_facts.generation->changeText();
     else
         out << "Frame rate  " << rate << '\n'
-            << "Change EDL  " << describeEvents(model.changeEdl(), facts_.changeNames) << '\n';
-    const std::vector<std::string> settings = unusualSettings(model.settings(), clock_, facts_.timeOrigin);
+            << "Change EDL  " << describeEvents(model.changeEdl(), m_facts.changeNames) << '\n';
+    const std::vector<std::string> settings = unusualSettings(model.settings(), m_clock, m_facts.timeOrigin);
     if (!settings.empty())
         out << "Settings    " << joined(settings) << '\n';
-    out << "Applied     " << counted(facts_.appliedCount(), "event") << " in " << secondsText(facts_.seconds) << '\n';
+    out << "Applied     " << counted(m_facts.appliedCount(), "event") << " in " << secondsText(m_facts.seconds) << '\n';
     printPassedOver(out);
 
     printClips(out);
@@ -195,10 +197,10 @@ void ApplyListing::printTotals(std::ostream& out) const
 
 void ApplyListing::printPassedOver(std::ostream& out) const
 {
-    if (facts_.passedOver.empty())
+    if (m_facts.passedOver.empty())
         return;
-    out << "Passed over " << counted(facts_.passedOver.size(), "event") << '\n';
-    for (const PassedOver& passed : facts_.passedOver)
+    out << "Passed over " << counted(m_facts.passedOver.size(), "event") << '\n';
+    for (const PassedOver& passed : m_facts.passedOver)
         out << "            " << eventText(*passed.event) << ": " << passed.reason << '\n';
 }
 
@@ -206,13 +208,13 @@ void ApplyListing::printClips(std::ostream& out) const
 {
     FateCount clips;
     FateCount markers;
-    for (const TrackComparison* const track : facts_.userTracks())
+    for (const TrackComparison* const track : m_facts.userTracks())
         (track->track->kind() == Track::Kind::Marker ? markers : clips) += *track;
     out << "Clips       " << inWords(clips) << '\n';
     if (markers.all + markers.added > 0)
         out << "Own markers " << inWords(markers) << '\n';
     std::vector<std::string> marked;
-    for (const TrackComparison* const track : facts_.markedTracks())
+    for (const TrackComparison* const track : m_facts.markedTracks())
         marked.push_back(std::to_string(track->added.size()) + " " + printableName(track->track->name()));
     out << "New markers " << (marked.empty() ? "none" : joined(marked)) << '\n';
 }
@@ -220,11 +222,11 @@ void ApplyListing::printClips(std::ostream& out) const
 void ApplyListing::printWritten(std::ostream& out) const
 {
     std::vector<std::string> written;
-    for (const std::string& file : {facts_.written, facts_.jsonFile}) {
+    for (const std::string& file : {m_facts.written, m_facts.jsonFile}) {
         if (!file.empty())
             written.push_back(toPrintable(file).text);
     }
-    if (facts_.written.empty())
+    if (m_facts.written.empty())
         written.emplace_back("no project; give -o PROJECT.stage or --in-place");
     out << "Written     " << joined(written) << '\n';
 }
@@ -240,10 +242,10 @@ void ApplyListing::printTrackTotals(std::ostream& out) const
     };
     Columns columns({"track", "holds", "stay", "moved", "trimmed", "split", "doubled", "in no cut", "new"},
                     {1, 2, 3, 4, 5, 6, 7, 8});
-    for (const TrackComparison* const track : facts_.userTracks())
+    for (const TrackComparison* const track : m_facts.userTracks())
         columns.measure(rowOf(*track));
     out << columns.titleLine() << '\n';
-    for (const TrackComparison* const track : facts_.userTracks())
+    for (const TrackComparison* const track : m_facts.userTracks())
         out << columns.lineOf(rowOf(*track)) << '\n';
 }
 
@@ -253,18 +255,18 @@ void ApplyListing::printMoves(std::ostream& out) const
         for (const Fate& fate : track.fates) {
             if (fate.stays())
                 continue;
-            for (const Columns::Row& row : rowsOf(fate, clock_))
+            for (const Columns::Row& row : rowsOf(fate, m_clock))
                 visit(row);
         }
         for (const Placement& placement : track.added)
-            visit(rowOfNew(placement, clock_));
+            visit(rowOfNew(placement, m_clock));
     };
     Columns columns(MoveTitles);
-    for (const TrackComparison* const track : facts_.userTracks())
+    for (const TrackComparison* const track : m_facts.userTracks())
         visitMoves(*track, [&](const Columns::Row& row) { columns.measure(row); });
 
     printTrackTotals(out);
-    for (const TrackComparison* const track : facts_.userTracks()) {
+    for (const TrackComparison* const track : m_facts.userTracks()) {
         if (countOf(*track).stay == track->fates.size() && track->added.empty())
             continue;
         out << '\n' << pathOf(*track->track) << "\n  " << columns.titleLine() << '\n';
@@ -275,16 +277,16 @@ void ApplyListing::printMoves(std::ostream& out) const
 void ApplyListing::printMarkers(std::ostream& out) const
 {
     const auto rowOf = [this](const Placement& marker) {
-        return Columns::Row{clock_.exactTimecode(marker.start), clock_.exactTimecode(marker.end),
-                            clock_.exactLength(marker.length()), printableName(marker.name, MostCharactersOfAMarker)};
+        return Columns::Row{m_clock.exactTimecode(marker.start), m_clock.exactTimecode(marker.end),
+                            m_clock.exactLength(marker.length()), printableName(marker.name, MostCharactersOfAMarker)};
     };
     Columns columns({"in", "out", "length", "marker"});
-    for (const TrackComparison* const track : facts_.markedTracks()) {
+    for (const TrackComparison* const track : m_facts.markedTracks()) {
         for (const Placement& marker : track->added)
             columns.measure(rowOf(marker));
     }
     const char* separator = "";
-    for (const TrackComparison* const track : facts_.markedTracks()) {
+    for (const TrackComparison* const track : m_facts.markedTracks()) {
         out << separator << printableName(track->track->name()) << ", " << counted(track->added.size(), "marker")
             << "\n  " << columns.titleLine() << '\n';
         separator = "\n";

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "app/apply/ApplyFacts.h"
@@ -11,7 +13,7 @@ namespace cadrel::app {
 class ApplyListing {
 public:
     /// Both outlive the listing.
-    ApplyListing(const ApplyFacts& facts, const ProjectClock& clock) : facts_(facts), clock_(clock) {}
+    ApplyListing(const ApplyFacts& facts, const ProjectClock& clock) : m_facts(facts), m_clock(clock) {}
 
     void printTotals(std::ostream& out) const;
     /// A line for each track on which something lay, and then, track by track, one for all that isn't as it was.
@@ -25,8 +27,8 @@ private:
     void printWritten(std::ostream& out) const;
     void printTrackTotals(std::ostream& out) const;
 
-    const ApplyFacts& facts_;
-    const ProjectClock& clock_;
+    const ApplyFacts& m_facts;
+    const ProjectClock& m_clock;
 };
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/apply/HostedProject.h"
 
 #include "app/Failure.h"
@@ -41,43 +43,43 @@ std::u16string_view lastEntryOf(const standin::UndoList& undoList)
 } // namespace
 
 HostedProject::HostedProject(const std::string& file, const Terminal& terminal)
-    : file_(file), application_(standin::Terminal(std::cerr, terminal.showsProgress(), Interruption::request())),
-      host_(Velmark::makeCounted<host::Host>(application_.context()))
+    : m_file(file), m_application(standin::Terminal(std::cerr, terminal.showsProgress(), Interruption::request())),
+      m_host(Velmark::makeCounted<host::Host>(m_application.context()))
 {
     requireReadableProject(file);
     try {
-        project_ = &application_.openProject(file);
+        m_project = &m_application.openProject(file);
     } catch (const ProjectFileError& error) {
         throw readingFailure(error, file);
     }
-    application_.activateProject(project_);
+    m_application.activateProject(m_project);
 }
 
 HostedProject::~HostedProject() = default;
 
 core::DataModel& HostedProject::model()
 {
-    return *host_->getProjectModel();
+    return *m_host->getProjectModel();
 }
 
 void HostedProject::apply()
 {
     // A project can have been saved in the middle of a preview.
-    if (host_->isPreviewActive())
-        host_->setPreviewActive(false);
-    const Result::Type result = host_->startCadrel();
+    if (m_host->isPreviewActive())
+        m_host->setPreviewActive(false);
+    const Result::Type result = m_host->startCadrel();
     if (result != Result::Ok)
-        throw startFailure(result, file_);
-    application_.idle();
+        throw startFailure(result, m_file);
+    m_application.idle();
     Interruption::check();
-    if (lastEntryOf(project_->undoList()) != u"Apply Cadrel")
-        throw Failure{file_, "the run broke off before its end", "report it with the files"};
+    if (lastEntryOf(m_project->undoList()) != u"Apply Cadrel")
+        throw Failure{m_file, "the run broke off before its end", "report it with the files"};
 }
 
 void HostedProject::save(const std::string& file)
 {
     try {
-        application_.saveProject(*project_, file);
+        m_application.saveProject(*m_project, file);
     } catch (const ProjectFileError& error) {
         throw writingFailure(error, file);
     }

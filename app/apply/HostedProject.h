@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "standin/Application.h"
@@ -27,7 +29,7 @@ public:
     HostedProject& operator=(const HostedProject&) = delete;
     ~HostedProject();
 
-    standin::Project& project() { return *project_; }
+    standin::Project& project() { return *m_project; }
     core::DataModel& model();
 
     /// Applies the change list of the model. An Interruption cancels it, and what has been done is taken back. Throws
@@ -38,10 +40,10 @@ public:
     void save(const std::string& file);
 
 private:
-    std::string file_;
-    standin::Application application_;
-    Velmark::Counted<host::Host> host_;
-    standin::Project* project_ = nullptr;
+    std::string m_file;
+    standin::Application m_application;
+    Velmark::Counted<host::Host> m_host;
+    standin::Project* m_project = nullptr;
 };
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/apply/ProgrammeShift.h"
 
 #include <iterator>
@@ -8,26 +10,26 @@ void ProgrammeShift::add(double start, double end, double shift)
 {
     if (!(start < end))
         return;
-    auto next = stretches_.lower_bound(start);
-    if (next != stretches_.begin()) {
+    auto next = m_stretches.lower_bound(start);
+    if (next != m_stretches.begin()) {
         Stretch& before = std::prev(next)->second;
         if (before.end > end)
-            stretches_.emplace(end, before);
+            m_stretches.emplace(end, before);
         if (before.end > start)
             before.end = start;
     }
-    while (next != stretches_.end() && next->first < end) {
+    while (next != m_stretches.end() && next->first < end) {
         if (next->second.end > end)
-            stretches_.emplace(end, next->second);
-        next = stretches_.erase(next);
+            m_stretches.emplace(end, next->second);
+        next = m_stretches.erase(next);
     }
-    stretches_.emplace(start, Stretch{end, shift});
+    m_stretches.emplace(start, Stretch{end, shift});
 }
 
 std::optional<double> ProgrammeShift::at(double time) const
 {
-    const auto behind = stretches_.upper_bound(time);
-    if (behind == stretches_.begin())
+    const auto behind = m_stretches.upper_bound(time);
+    if (behind == m_stretches.begin())
         return std::nullopt;
     const Stretch& stretch = std::prev(behind)->second;
     return time < stretch.end ? std::optional(stretch.shift) : std::nullopt;

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <map>
@@ -24,7 +26,7 @@ private:
         double shift;
     };
 
-    std::map<double, Stretch> stretches_; ///< by their starts; they don't overlap
+    std::map<double, Stretch> m_stretches; ///< by their starts; they don't overlap
 };
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/apply/ProjectComparison.h"
 
 #include "app/apply/ProgrammeShift.h"
@@ -69,15 +71,15 @@ public:
     explicit Origins(std::vector<Fate>& fates)
     {
         for (Fate& fate : fates)
-            groups_[keyOf(fate.before)].emplace(syncOf(fate.before), &fate);
+            m_groups[keyOf(fate.before)].emplace(syncOf(fate.before), &fate);
     }
 
     /// What stood `shift` earlier and holds the piece; of clips else the one nearest to that. Nothing when there is none.
     /// Without a shift nothing goes to where the piece stands, unless a clip hangs over.
     std::optional<Origin> find(const Placement& now, std::optional<double> shift) const
     {
-        const auto group = groups_.find(keyOf(now));
-        if (group == groups_.end())
+        const auto group = m_groups.find(keyOf(now));
+        if (group == m_groups.end())
             return std::nullopt;
         if (now.kind == Placement::Kind::Clip)
             return nearestClip(group->second, now, shift.value_or(0.0));
@@ -126,7 +128,7 @@ private:
         return std::nullopt;
     }
 
-    std::map<Key, Sources> groups_;
+    std::map<Key, Sources> m_groups;
 };
 
 /// A run carries nothing to one place twice: the second of two like markers there is new.

@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/Coverage.h"
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
-#include "core/HealedEvent.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/edl/HealedEvent.h"
 
 #include <algorithm>
 #include <iterator>

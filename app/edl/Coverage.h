@@ -1,6 +1,8 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/Timecode.h"
+#include "core/time/Timecode.h"
 
 #include <cstddef>
 #include <cstdint>

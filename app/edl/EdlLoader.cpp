@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/EdlLoader.h"
 
 #include "app/Failure.h"
@@ -6,9 +8,9 @@
 #include "app/Terminal.h"
 #include "app/Wording.h"
 #include "app/edl/ProjectFramerate.h"
-#include "core/EventBase.h"
-#include "core/Timecode.h"
+#include "core/edl/EventBase.h"
 #include "core/fileio/CmxParser.h"
+#include "core/time/Timecode.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
@@ -70,8 +72,8 @@ bool exceeds(const EventBase& event, std::int32_t framesPerSecond)
 
 Framerate EdlLoader::chooseRate(const std::string& firstFile) const
 {
-    if (!options_.rateLabel.empty())
-        return Framerate::fromLabel(options_.rateLabel);
+    if (!m_options.rateLabel.empty())
+        return Framerate::fromLabel(m_options.rateLabel);
     Framerate shown;
     if (core::fileio::CmxParser().detect(toWide(firstFile), shown) != Result::Ok)
         throw unreadable(firstFile);
@@ -112,9 +114,9 @@ void EdlLoader::refuseUnreadable(const LoadedEdl& edl)
 void EdlLoader::load(LoadedEdl& edl) const
 {
     const std::wstring path = toWide(edl.path);
-    terminal_.showProgress("reading " + fileNameOf(edl.path));
+    m_terminal.showProgress("reading " + fileNameOf(edl.path));
     try {
-        edl.events.load(path, true, edl.shown, options_.renameBRolls, options_.acceptAudio);
+        edl.events.load(path, true, edl.shown, m_options.renameBRolls, m_options.acceptAudio);
     } catch (const Result::Type&) {
         throw unreadable(edl.path);
     }
@@ -141,10 +143,10 @@ void EdlLoader::checkRate(const LoadedEdl& edl) const
         faster
             ? "shows " + std::to_string(edl.shown.framesPerSecond) + " fps, more than the " + label + " of the project"
             : counted(edl.events.countInvalidTimecodes(), "event") + " with timecodes that don't exist at " + label;
-    const Failure failure{edl.path, where.empty() ? what : what + ", first in " + where, options_.rateAdvice};
-    if (options_.strict)
+    const Failure failure{edl.path, where.empty() ? what : what + ", first in " + where, m_options.rateAdvice};
+    if (m_options.strict)
         throw failure;
-    terminal_.warn(failure);
+    m_terminal.warn(failure);
 }
 
 } // namespace cadrel::app

@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/EventList.h"
-#include "core/Framerate.h"
+#include "core/edl/EventList.h"
+#include "core/time/Framerate.h"
 
 #include <list>
 #include <string>
@@ -29,7 +31,7 @@ struct LoadedEdl {
 /// Reads EDL files one by one, each into a list of its own, and warns of those that don't fit the project's rate.
 class EdlLoader {
 public:
-    EdlLoader(const LoadOptions& options, Terminal& terminal) : options_(options), terminal_(terminal) {}
+    EdlLoader(const LoadOptions& options, Terminal& terminal) : m_options(options), m_terminal(terminal) {}
 
     /// The rate under which all files are to be read: that of the label, else that which `firstFile` shows.
     /// Throws Failure when it shows none.
@@ -46,8 +48,8 @@ private:
     void load(LoadedEdl& edl) const;
     void checkRate(const LoadedEdl& edl) const;
 
-    LoadOptions options_;
-    Terminal& terminal_;
+    LoadOptions m_options;
+    Terminal& m_terminal;
 };
 
 } // namespace cadrel::app

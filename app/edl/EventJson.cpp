@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/EventJson.h"
 
-#include "core/EventList.h"
-#include "core/HealedEvent.h"
+#include "core/edl/EventList.h"
+#include "core/edl/HealedEvent.h"
 
 namespace cadrel::app {
 

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/EventTable.h"
 
 #include "app/Printable.h"
@@ -70,15 +72,15 @@ std::string speedOf(const EventBase& event)
 const EventTable::Row EventTable::Titles{"state",  "event",   "roll",   "clip",    "file", "trans",
                                          "src in", "src out", "dst in", "dst out", "speed"};
 
-EventTable::EventTable(Events events, bool colour) : events_(events), colour_(colour)
+EventTable::EventTable(Events events, bool colour) : m_events(events), m_colour(colour)
 {
-    std::transform(Titles.begin(), Titles.end(), columnWidths_.begin(),
+    std::transform(Titles.begin(), Titles.end(), m_columnWidths.begin(),
                    [](const std::string& title) { return title.size(); });
     Widths widths{};
-    for (const auto& event : events_) {
+    for (const auto& event : m_events) {
         rowOf(*event, widths);
         for (std::size_t column = 0; column < ColumnCount; ++column)
-            columnWidths_[column] = std::max(columnWidths_[column], widths[column]);
+            m_columnWidths[column] = std::max(m_columnWidths[column], widths[column]);
     }
 }
 
@@ -87,10 +89,10 @@ void EventTable::print(std::ostream& out) const
     Widths widths{};
     std::transform(Titles.begin(), Titles.end(), widths.begin(), [](const std::string& title) { return title.size(); });
     out << lineOf(Titles, widths) << '\n';
-    for (const auto& event : events_) {
+    for (const auto& event : m_events) {
         const Row row = rowOf(*event, widths);
         const std::string line = lineOf(row, widths);
-        if (!colour_) {
+        if (!m_colour) {
             out << line << '\n';
         } else {
             const std::size_t state = row.front().size();
@@ -131,7 +133,7 @@ std::string EventTable::lineOf(const Row& row, const Widths& widths) const
 {
     std::string line;
     for (std::size_t column = 0; column < ColumnCount; ++column) {
-        const std::string fill(columnWidths_[column] - widths[column], ' ');
+        const std::string fill(m_columnWidths[column] - widths[column], ' ');
         const bool last = column + 1 == ColumnCount;
         line += last ? fill + row[column] : row[column] + fill + "  ";
     }

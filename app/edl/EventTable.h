@@ -1,6 +1,8 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/EventBase.h"
+#include "core/edl/EventBase.h"
 
 #include <array>
 #include <cstddef>
@@ -30,9 +32,9 @@ private:
     static Row rowOf(const core::EventBase& event, Widths& widths);
     std::string lineOf(const Row& row, const Widths& widths) const;
 
-    Events events_;
-    bool colour_;
-    Widths columnWidths_;
+    Events m_events;
+    bool m_colour;
+    Widths m_columnWidths;
 };
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/GenerateCommand.h"
 
 #include "app/Failure.h"
@@ -10,8 +12,8 @@
 #include "app/edl/EventJson.h"
 #include "app/edl/GenerationReport.h"
 #include "app/edl/ProjectFramerate.h"
-#include "core/DataModel.h"
 #include "core/fileio/CmxWriter.h"
+#include "core/model/DataModel.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 

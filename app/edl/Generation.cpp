@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/Generation.h"
 
 #include "app/Failure.h"
@@ -5,8 +7,8 @@
 #include "app/Terminal.h"
 #include "app/Wording.h"
 #include "app/edl/GenerationFailure.h"
-#include "core/DataModel.h"
-#include "core/VfxNameMatcher.h"
+#include "core/model/DataModel.h"
+#include "core/settings/VfxNameMatcher.h"
 #include "util/Result.h"
 
 #include <cstddef>

@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/GenerationFailure.h"
 
-#include "core/DataModel.h"
-#include "core/EventList.h"
+#include "core/edl/EventList.h"
+#include "core/model/DataModel.h"
 #include "util/Result.h"
 
 #include <cstddef>

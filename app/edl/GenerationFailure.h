@@ -1,6 +1,8 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/EventBase.h"
+#include "core/edl/EventBase.h"
 
 #include <memory>
 

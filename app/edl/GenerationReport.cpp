@@ -1,10 +1,12 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/GenerationReport.h"
 
 #include "app/Printable.h"
 #include "app/Wording.h"
-#include "core/DataModel.h"
-#include "core/HealedEvent.h"
-#include "core/Timecode.h"
+#include "core/edl/HealedEvent.h"
+#include "core/model/DataModel.h"
+#include "core/time/Timecode.h"
 
 #include <utility>
 
@@ -41,42 +43,42 @@ std::string describeEvents(const EventList& events, const std::vector<std::strin
 }
 
 GenerationReport::GenerationReport(const DataModel& model, Cuts cuts, const Framerate& framerate)
-    : model_(model), cuts_(std::move(cuts)), framerate_(framerate),
-      coverage_(model.newEdl(), model.changeEdl(), framerate)
+    : m_model(model), m_cuts(std::move(cuts)), m_framerate(framerate),
+      m_coverage(model.newEdl(), model.changeEdl(), framerate)
 {
     for (const auto& event : model.changeEdl().events()) {
         if (const auto* healed = dynamic_cast<const HealedEvent*>(event.get())) {
-            ++healedEvents_;
-            healedMembers_ += healed->healedEvents().size();
+            ++m_healedEvents;
+            m_healedMembers += healed->healedEvents().size();
         }
     }
 }
 
 std::string GenerationReport::cutsText(const std::string& rate) const
 {
-    return "Old cut     " + describeEvents(model_.oldEdl(), cuts_.oldNames) + "\n" + //
-           "New cut     " + describeEvents(model_.newEdl(), cuts_.newNames) + "\n" + //
+    return "Old cut     " + describeEvents(m_model.oldEdl(), m_cuts.oldNames) + "\n" + //
+           "New cut     " + describeEvents(m_model.newEdl(), m_cuts.newNames) + "\n" + //
            "Frame rate  " + rate + "\n";
 }
 
 std::string GenerationReport::changeText() const
 {
     std::string healed;
-    if (healedEvents_ > 0)
-        healed = ", " + std::to_string(healedEvents_) + " of them healed from " + std::to_string(healedMembers_);
-    return "Change EDL  " + counted(model_.changeEdl().size(), "event") + healed + "\n" + //
-           "Covered     " + timecode(coverage_.coveredFrames) + " of " + timecode(coverage_.programmeFrames) + ", " +
-           percentOf(coverage_) + " %\n";
+    if (m_healedEvents > 0)
+        healed = ", " + std::to_string(m_healedEvents) + " of them healed from " + std::to_string(m_healedMembers);
+    return "Change EDL  " + counted(m_model.changeEdl().size(), "event") + healed + "\n" + //
+           "Covered     " + timecode(m_coverage.coveredFrames) + " of " + timecode(m_coverage.programmeFrames) + ", " +
+           percentOf(m_coverage) + " %\n";
 }
 
 std::string GenerationReport::insertsText() const
 {
-    if (coverage_.inserts.empty())
+    if (m_coverage.inserts.empty())
         return "Inserts     none\n";
-    std::string text = "Inserts     " + std::to_string(coverage_.inserts.size()) + ", together " +
-                       timecode(coverage_.insertedFrames()) + "\n\n" +
+    std::string text = "Inserts     " + std::to_string(m_coverage.inserts.size()) + ", together " +
+                       timecode(m_coverage.insertedFrames()) + "\n\n" +
                        "            in           out          length       shot\n";
-    for (const Insert& insert : coverage_.inserts) {
+    for (const Insert& insert : m_coverage.inserts) {
         text += "            " + timecode(insert.start) + "  " + timecode(insert.end) + "  " +
                 timecode(insert.frames()) + "  " + toPrintable(insert.shot, 40).text;
         text += insert.moreShots == 0 ? "\n" : " and " + std::to_string(insert.moreShots) + " more\n";
@@ -87,25 +89,25 @@ std::string GenerationReport::insertsText() const
 ordered_json GenerationReport::toJson() const
 {
     ordered_json inserts = ordered_json::array();
-    for (const Insert& insert : coverage_.inserts) {
+    for (const Insert& insert : m_coverage.inserts) {
         inserts.push_back({{"dstIn", timecode(insert.start)},
                            {"dstOut", timecode(insert.end)},
                            {"frames", insert.frames()},
                            {"shot", insert.shot},
                            {"moreShots", insert.moreShots}});
     }
-    return {{"old", sideToJson(model_.oldEdl(), cuts_.oldNames)},
-            {"new", sideToJson(model_.newEdl(), cuts_.newNames)},
-            {"healed", {{"events", healedEvents_}, {"members", healedMembers_}}},
-            {"programmeFrames", coverage_.programmeFrames},
-            {"coveredFrames", coverage_.coveredFrames},
+    return {{"old", sideToJson(m_model.oldEdl(), m_cuts.oldNames)},
+            {"new", sideToJson(m_model.newEdl(), m_cuts.newNames)},
+            {"healed", {{"events", m_healedEvents}, {"members", m_healedMembers}}},
+            {"programmeFrames", m_coverage.programmeFrames},
+            {"coveredFrames", m_coverage.coveredFrames},
             {"inserts", std::move(inserts)}};
 }
 
 std::string GenerationReport::timecode(std::int32_t frames) const
 {
     Timecode timecode;
-    timecode.setFrameCount(frames, framerate_);
+    timecode.setFrameCount(frames, m_framerate);
     return timecode.toString();
 }
 

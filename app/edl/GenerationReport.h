@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "app/edl/Coverage.h"
 #include "app/edl/Generation.h"
-#include "core/Framerate.h"
+#include "core/time/Framerate.h"
 
 #include <nlohmann/json.hpp>
 #include <string>
@@ -31,12 +33,12 @@ public:
 private:
     std::string timecode(std::int32_t frames) const;
 
-    const core::DataModel& model_;
-    Cuts cuts_;
-    core::Framerate framerate_;
-    std::size_t healedEvents_ = 0;  ///< events that stand for several
-    std::size_t healedMembers_ = 0; ///< those that they stand for
-    Coverage coverage_;
+    const core::DataModel& m_model;
+    Cuts m_cuts;
+    core::Framerate m_framerate;
+    std::size_t m_healedEvents = 0;  ///< events that stand for several
+    std::size_t m_healedMembers = 0; ///< those that they stand for
+    Coverage m_coverage;
 };
 
 /// The names of EDL files and what is in them: "a.edl, b.edl: 12 events, all valid".

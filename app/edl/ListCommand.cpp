@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/ListCommand.h"
 
 #include "app/Failure.h"
@@ -9,8 +11,8 @@
 #include "app/edl/EventJson.h"
 #include "app/edl/EventTable.h"
 #include "app/edl/ProjectFramerate.h"
-#include "core/EventBase.h"
-#include "core/Timecode.h"
+#include "core/edl/EventBase.h"
+#include "core/time/Timecode.h"
 
 #include <array>
 #include <cstddef>

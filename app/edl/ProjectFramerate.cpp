@@ -1,6 +1,8 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/edl/ProjectFramerate.h"
 
-#include "core/Timecode.h"
+#include "core/time/Timecode.h"
 
 #include <algorithm>
 
@@ -9,7 +11,7 @@ namespace cadrel::app {
 using core::Framerate;
 using core::Timecode;
 
-ProjectFramerate::ProjectFramerate(const Framerate& framerate) : framerate_(framerate)
+ProjectFramerate::ProjectFramerate(const Framerate& framerate) : m_framerate(framerate)
 {
     Timecode::setFramerateProvider(this);
 }

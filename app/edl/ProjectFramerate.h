@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/Framerate.h"
-#include "core/FramerateProvider.h"
+#include "core/time/Framerate.h"
+#include "core/time/FramerateProvider.h"
 
 #include <array>
 #include <optional>
@@ -23,7 +25,7 @@ public:
     ProjectFramerate& operator=(const ProjectFramerate&) = delete;
     ~ProjectFramerate();
 
-    core::Framerate getFramerate() const override { return framerate_; }
+    core::Framerate getFramerate() const override { return m_framerate; }
 
     /// The rate that a file shows, as a project has it: an unknown drop-frame state counts as non-drop. Nothing when
     /// the file shows no rate.
@@ -32,7 +34,7 @@ public:
     static std::string labelOf(const core::Framerate& framerate);
 
 private:
-    core::Framerate framerate_;
+    core::Framerate m_framerate;
 };
 
 } // namespace cadrel::app

@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/project/ProjectClock.h"
 
 #include "app/edl/ProjectFramerate.h"
-#include "core/Timecode.h"
-#include "host/HostFramerate.h"
+#include "core/time/Timecode.h"
+#include "host/project/HostFramerate.h"
 
 #include <array>
 #include <cmath>
@@ -25,40 +27,40 @@ std::string signOf(double frame)
 } // namespace
 
 ProjectClock::ProjectClock(const Velmark::FrameRateInfo& rate, double origin)
-    : framerate_(host::framerateOf(rate)), origin_(origin)
+    : m_framerate(host::framerateOf(rate)), m_origin(origin)
 {
 }
 
 std::string ProjectClock::rateLabel() const
 {
     // Of a rate between the usual ones the number itself.
-    if (framerate_.rate != framerate_.framesPerSecond && !framerate_.pulledDown) {
+    if (m_framerate.rate != m_framerate.framesPerSecond && !m_framerate.pulledDown) {
         std::array<char, 32> text{};
-        std::snprintf(text.data(), text.size(), "%.6g fps", framerate_.rate);
+        std::snprintf(text.data(), text.size(), "%.6g fps", m_framerate.rate);
         return text.data();
     }
-    return ProjectFramerate::labelOf(framerate_);
+    return ProjectFramerate::labelOf(m_framerate);
 }
 
 std::string ProjectClock::rateInWords() const
 {
     std::string words;
-    if (framerate_.dropFrame == 1)
+    if (m_framerate.dropFrame == 1)
         words = "drop-frame";
-    if (framerate_.pulledDown)
+    if (m_framerate.pulledDown)
         words += words.empty() ? "pulled down" : ", pulled down";
     return rateLabel() + (words.empty() ? "" : " (" + words + ")");
 }
 
 std::string ProjectClock::toText(double seconds) const
 {
-    const double frame = std::floor(seconds * framerate_.rate + 0.5);
+    const double frame = std::floor(seconds * m_framerate.rate + 0.5);
     return signOf(frame) + frameText(std::abs(frame));
 }
 
 std::string ProjectClock::toExactText(double seconds) const
 {
-    const double subframes = std::floor(std::abs(seconds) * framerate_.rate * SubframesOfAFrame + 0.5);
+    const double subframes = std::floor(std::abs(seconds) * m_framerate.rate * SubframesOfAFrame + 0.5);
     const double frame = std::floor(subframes / SubframesOfAFrame);
     std::string text = signOf(std::copysign(subframes, seconds));
     text += frameText(frame);
@@ -72,10 +74,10 @@ std::string ProjectClock::toExactText(double seconds) const
 
 std::string ProjectClock::frameText(double frame) const
 {
-    const double framesOfADay = framerate_.lastFrame + 1.0;
+    const double framesOfADay = m_framerate.lastFrame + 1.0;
     const double day = std::floor(frame / framesOfADay);
     Timecode timecode;
-    timecode.setFrameCount(static_cast<std::int32_t>(frame - day * framesOfADay), framerate_);
+    timecode.setFrameCount(static_cast<std::int32_t>(frame - day * framesOfADay), m_framerate);
     return Timecode(timecode.hours() + static_cast<std::int32_t>(24.0 * day), timecode.minutes(), timecode.seconds(),
                     timecode.frames())
         .toString();

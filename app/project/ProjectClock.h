@@ -1,6 +1,8 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/Framerate.h"
+#include "core/time/Framerate.h"
 #include "velmark/Project.h"
 
 #include <string>
@@ -20,10 +22,10 @@ public:
     std::string rateLabel() const;
 
     /// The timecode of a time of the project to the nearest frame, and for a length.
-    std::string timecode(double seconds) const { return toText(origin_ + seconds); }
+    std::string timecode(double seconds) const { return toText(m_origin + seconds); }
     std::string length(double seconds) const { return toText(seconds); }
     /// With the hundredths of a frame behind what doesn't lie on one: "03:00:07:12.25".
-    std::string exactTimecode(double seconds) const { return toExactText(origin_ + seconds); }
+    std::string exactTimecode(double seconds) const { return toExactText(m_origin + seconds); }
     std::string exactLength(double seconds) const { return toExactText(seconds); }
 
 private:
@@ -32,8 +34,8 @@ private:
     /// Of a count from 0 up.
     std::string frameText(double frame) const;
 
-    core::Framerate framerate_;
-    double origin_;
+    core::Framerate m_framerate;
+    double m_origin;
 };
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/project/ProjectJson.h"
 
 #include "standin/file/Utf16.h"
@@ -64,50 +66,50 @@ const char* kindOf(const MediaClip& clip)
 } // namespace
 
 ProjectJson::ProjectJson(standin::Project& project, const ProjectClock& clock, Sink sink)
-    : project_(project), clock_(clock), sink_(std::move(sink))
+    : m_project(project), m_clock(clock), m_sink(std::move(sink))
 {
 }
 
 void ProjectJson::write(const std::string& fileName, const Tracks& tracks) const
 {
-    const Velmark::FrameRateInfo rate = project_.frameRate();
+    const Velmark::FrameRateInfo rate = m_project.frameRate();
     using Flag = Velmark::FrameRateInfo::Flag;
     const ordered_json facts{
         {"file", fileName},
-        {"name", toUtf8(project_.name())},
+        {"name", toUtf8(m_project.name())},
         {"frameRate",
-         {{"label", clock_.rateLabel()},
+         {{"label", m_clock.rateLabel()},
           {"framesPerSecond", rate.framesPerSecond},
           {"dropFrame", (rate.flags & Flag::DropFrame) != 0},
           {"pulledDown", (rate.flags & Flag::PulledDown) != 0}}},
-        {"timeOrigin", {{"seconds", project_.timeOrigin()}, {"timecode", clock_.timecode(0.0)}}},
-        {"end", time(project_.getEnd(nullptr))},
-        {"locators", range(project_.locatorLeft(), project_.locatorRight())},
-        {"cycle", range(project_.cycleLeft(), project_.cycleRight())},
-        {"position", time(project_.position().getValue())},
-        {"attributes", attributesOf(project_)},
+        {"timeOrigin", {{"seconds", m_project.timeOrigin()}, {"timecode", m_clock.timecode(0.0)}}},
+        {"end", time(m_project.getEnd(nullptr))},
+        {"locators", range(m_project.locatorLeft(), m_project.locatorRight())},
+        {"cycle", range(m_project.cycleLeft(), m_project.cycleRight())},
+        {"position", time(m_project.position().getValue())},
+        {"attributes", attributesOf(m_project)},
     };
-    sink_("{\n");
+    m_sink("{\n");
     for (const auto& [key, value] : facts.items())
-        sink_(textOf(key) + ": " + textOf(value) + ",\n");
-    sink_("\"pool\": [");
+        m_sink(textOf(key) + ": " + textOf(value) + ",\n");
+    m_sink("\"pool\": [");
     const char* separator = "\n";
-    for (const auto& [number, clip] : project_.pool().clips()) {
-        sink_(separator + textOf({{"number", number},
-                                  {"kind", kindOf(*clip)},
-                                  {"name", toUtf8(clip->name())},
-                                  {"file", toUtf8(clip->path())},
-                                  {"length", length(clip->seconds())}}));
+    for (const auto& [number, clip] : m_project.pool().clips()) {
+        m_sink(separator + textOf({{"number", number},
+                                   {"kind", kindOf(*clip)},
+                                   {"name", toUtf8(clip->name())},
+                                   {"file", toUtf8(clip->path())},
+                                   {"length", length(clip->seconds())}}));
         separator = ",\n";
     }
-    sink_("\n],\n\"tracks\": [");
+    m_sink("\n],\n\"tracks\": [");
     separator = "\n";
     for (const Track* track : tracks) {
-        sink_(separator);
+        m_sink(separator);
         writeTrack(*track);
         separator = ",\n";
     }
-    sink_("\n]\n}\n");
+    m_sink("\n]\n}\n");
 }
 
 void ProjectJson::writeTrack(const Track& track) const
@@ -115,65 +117,65 @@ void ProjectJson::writeTrack(const Track& track) const
     ordered_json folders = ordered_json::array();
     for (const Track* folder : foldersAround(track))
         folders.push_back(toUtf8(folder->name()));
-    sink_(openTextOf({{"name", toUtf8(track.name())},
-                      {"kind", Track::wordOf(track.kind())},
-                      {"folders", std::move(folders)},
-                      {"locked", track.isLocked()},
-                      {"selected", track.selected()},
-                      {"attributes", attributesOf(track)}}) +
-          ", \"events\": [");
+    m_sink(openTextOf({{"name", toUtf8(track.name())},
+                       {"kind", Track::wordOf(track.kind())},
+                       {"folders", std::move(folders)},
+                       {"locked", track.isLocked()},
+                       {"selected", track.selected()},
+                       {"attributes", attributesOf(track)}}) +
+           ", \"events\": [");
     if (!track.isFolder())
         writeEvents(track, 0.0, 0);
-    sink_("], \"automation\": [");
+    m_sink("], \"automation\": [");
     const char* separator = "\n";
     for (const auto& [number, curve] : track.curves()) {
         if (curve->childCount() == 0)
             continue;
-        sink_(separator);
+        m_sink(separator);
         writeCurve(*curve);
         separator = ",\n";
     }
-    sink_("]}");
+    m_sink("]}");
 }
 
 void ProjectJson::writeEvents(const standin::Container& container, double start, std::size_t depth) const
 {
     const char* separator = "\n";
     visitEvents(container, start, depth, [&](const PlacedEvent& placed) {
-        sink_(separator);
+        m_sink(separator);
         separator = ",\n";
         const ordered_json facts = factsOf(placed);
         if (!dynamic_cast<const standin::Part*>(&placed.event)) {
-            sink_(textOf(facts));
+            m_sink(textOf(facts));
             return;
         }
-        sink_(openTextOf(facts) + ", \"events\": [");
+        m_sink(openTextOf(facts) + ", \"events\": [");
         writeEvents(placed.event, placed.start, depth + 1);
-        sink_("]}");
+        m_sink("]}");
     });
 }
 
 void ProjectJson::writeCurve(const standin::Envelope& curve) const
 {
-    sink_(openTextOf({{"curve", curve.number()}, {"name", nameOfCurve(curve.number())}}) + ", \"points\": [");
+    m_sink(openTextOf({{"curve", curve.number()}, {"name", nameOfCurve(curve.number())}}) + ", \"points\": [");
     const char* separator = "\n";
     for (const Node* point = curve.firstChild(); point; point = curve.childBehind(*point)) {
         ordered_json facts = time(point->start());
         facts["value"] = static_cast<const AutomationPoint*>(point)->value();
-        sink_(separator + textOf(facts));
+        m_sink(separator + textOf(facts));
         separator = ",\n";
     }
-    sink_("]}");
+    m_sink("]}");
 }
 
 ordered_json ProjectJson::time(double seconds) const
 {
-    return {{"seconds", seconds}, {"timecode", clock_.timecode(seconds)}};
+    return {{"seconds", seconds}, {"timecode", m_clock.timecode(seconds)}};
 }
 
 ordered_json ProjectJson::length(double seconds) const
 {
-    return {{"seconds", seconds}, {"timecode", clock_.length(seconds)}};
+    return {{"seconds", seconds}, {"timecode", m_clock.length(seconds)}};
 }
 
 ordered_json ProjectJson::range(standin::Parameter& left, standin::Parameter& right) const

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "app/project/ProjectClock.h"
@@ -33,9 +35,9 @@ private:
     nlohmann::ordered_json range(standin::Parameter& left, standin::Parameter& right) const;
     nlohmann::ordered_json factsOf(const PlacedEvent& placed) const;
 
-    standin::Project& project_;
-    const ProjectClock& clock_;
-    Sink sink_;
+    standin::Project& m_project;
+    const ProjectClock& m_clock;
+    Sink m_sink;
 };
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "app/project/ProjectListing.h"
 
 #include "app/Printable.h"
@@ -133,16 +135,16 @@ std::string stateOf(const Track& track, const std::string& locked, const std::st
 } // namespace
 
 ProjectListing::ProjectListing(standin::Project& project, const ProjectClock& clock, bool colour)
-    : project_(project), clock_(clock), colour_(colour)
+    : m_project(project), m_clock(clock), m_colour(colour)
 {
 }
 
 void ProjectListing::printFacts(std::ostream& out, const std::string& fileName) const
 {
     const auto range = [this](standin::Parameter& left, standin::Parameter& right) {
-        return clock_.exactTimecode(left.getValue()) + " - " + clock_.exactTimecode(right.getValue());
+        return m_clock.exactTimecode(left.getValue()) + " - " + m_clock.exactTimecode(right.getValue());
     };
-    const Tracks tracks = tracksOf(project_);
+    const Tracks tracks = tracksOf(m_project);
     ContentCount content;
     double contentEnd = 0.0;
     for (const Track* track : tracks) {
@@ -151,21 +153,21 @@ void ProjectListing::printFacts(std::ostream& out, const std::string& fileName) 
     }
 
     out << "Project      " << toPrintable(fileName).text << '\n';
-    if (!project_.name().empty())
-        out << "Name         " << printableName(project_.name()) << '\n';
-    out << "Frame rate   " << clock_.rateInWords() << '\n';
-    out << "Time origin  " << clock_.exactTimecode(0.0) << '\n';
-    out << "End          " << clock_.exactTimecode(project_.getEnd(nullptr)) << ", content to "
-        << clock_.exactTimecode(contentEnd) << '\n';
-    out << "Locators     " << range(project_.locatorLeft(), project_.locatorRight()) << '\n';
-    out << "Cycle        " << range(project_.cycleLeft(), project_.cycleRight()) << '\n';
-    out << "Position     " << clock_.exactTimecode(project_.position().getValue()) << '\n';
+    if (!m_project.name().empty())
+        out << "Name         " << printableName(m_project.name()) << '\n';
+    out << "Frame rate   " << m_clock.rateInWords() << '\n';
+    out << "Time origin  " << m_clock.exactTimecode(0.0) << '\n';
+    out << "End          " << m_clock.exactTimecode(m_project.getEnd(nullptr)) << ", content to "
+        << m_clock.exactTimecode(contentEnd) << '\n';
+    out << "Locators     " << range(m_project.locatorLeft(), m_project.locatorRight()) << '\n';
+    out << "Cycle        " << range(m_project.cycleLeft(), m_project.cycleRight()) << '\n';
+    out << "Position     " << m_clock.exactTimecode(m_project.position().getValue()) << '\n';
     out << "Tracks       " << kindsOf(tracks) << '\n';
     out << "Content      " << counted(content.clips, "clip") << ", " << counted(content.parts, "part") << ", "
         << counted(content.markers, "marker") << ", " << counted(content.points, "automation point") << '\n';
-    out << "Pool         " << kindsOf(project_.pool()) << '\n';
+    out << "Pool         " << kindsOf(m_project.pool()) << '\n';
     const char* title = "Attributes   ";
-    for (const std::string& attribute : attributesOf(project_)) {
+    for (const std::string& attribute : attributesOf(m_project)) {
         out << title << attribute << '\n';
         title = "             ";
     }
@@ -173,7 +175,7 @@ void ProjectListing::printFacts(std::ostream& out, const std::string& fileName) 
 
 void ProjectListing::printTree(std::ostream& out) const
 {
-    const Tracks tracks = tracksOf(project_);
+    const Tracks tracks = tracksOf(m_project);
     const auto rowOf = [](const Track& track) {
         const std::size_t events = countContent(track).events();
         return Columns::Row{indentation(foldersAround(track).size()) + printableName(track.name()),
@@ -252,7 +254,7 @@ void ProjectListing::printEvents(std::ostream& out, const Track& track, const Co
 void ProjectListing::printCurve(std::ostream& out, standin::Envelope& curve) const
 {
     const auto textOfPoint = [this](const Node& point) {
-        return clock_.exactTimecode(point.start()) + " " + textOf(static_cast<const AutomationPoint&>(point).value());
+        return m_clock.exactTimecode(point.start()) + " " + textOf(static_cast<const AutomationPoint&>(point).value());
     };
     const std::size_t count = curve.childCount();
     const bool isLong = count > MostPoints;
@@ -278,13 +280,13 @@ void ProjectListing::printPool(std::ostream& out) const
     const auto rowOf = [this](const MediaClip& clip) {
         return Columns::Row{printableName(clip.name()),
                             clip.kind() == MediaClip::Kind::Video ? Velmark::TypeWord::Video : Velmark::TypeWord::Audio,
-                            clock_.exactLength(clip.seconds()), toPrintable(toUtf8(clip.path())).text};
+                            m_clock.exactLength(clip.seconds()), toPrintable(toUtf8(clip.path())).text};
     };
     Columns columns({"clip", "kind", "length", "file"});
-    for (const auto& [number, clip] : project_.pool().clips())
+    for (const auto& [number, clip] : m_project.pool().clips())
         columns.measure(rowOf(*clip));
     out << columns.titleLine() << '\n';
-    for (const auto& [number, clip] : project_.pool().clips())
+    for (const auto& [number, clip] : m_project.pool().clips())
         out << columns.lineOf(rowOf(*clip)) << '\n';
 }
 
@@ -294,22 +296,22 @@ Columns::Row ProjectListing::rowOf(const PlacedEvent& placed) const
     const auto* clipEvent = dynamic_cast<const ClipEvent*>(&event);
     const bool isInstant = event.length() == 0.0;
     Columns::Row row{indentation(placed.depth) + kindOf(event),
-                     clock_.exactTimecode(placed.start),
-                     isInstant ? "" : clock_.exactTimecode(placed.end),
-                     isInstant ? "" : clock_.exactLength(event.length()),
+                     m_clock.exactTimecode(placed.start),
+                     isInstant ? "" : m_clock.exactTimecode(placed.end),
+                     isInstant ? "" : m_clock.exactLength(event.length()),
                      printableName(event.name(), isMarker(event) ? MostCharactersOfAMarker : MostCharactersOfAName),
                      "",
                      ""};
     if (clipEvent) {
         row[ClipColumn] = clipEvent->clip() ? printableName(clipEvent->clip()->name()) : "(no clip)";
-        row[SourceColumn] = clock_.exactLength(clipEvent->sourceOffset());
+        row[SourceColumn] = m_clock.exactLength(clipEvent->sourceOffset());
     }
     return row;
 }
 
 std::string ProjectListing::inColour(std::string_view colour, const std::string& text) const
 {
-    return colour_ ? std::string(colour) + text + std::string(Plain) : text;
+    return m_colour ? std::string(colour) + text + std::string(Plain) : text;
 }
 
 } // namespace cadrel::app

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "app/Columns.h"
@@ -31,9 +33,9 @@ private:
     Columns::Row rowOf(const PlacedEvent& placed) const;
     std::string inColour(std::string_view colour, const std::string& text) const;
 
-    standin::Project& project_;
-    const ProjectClock& clock_;
-    bool colour_;
+    standin::Project& m_project;
+    const ProjectClock& m_clock;
+    bool m_colour;
 };
 
 } // namespace cadrel::app

@@ -1,10 +1,12 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Makes the sound project of the example reel as it fits the old picture cut. Takes the EDL of that cut and the name of the
 // project file. The same EDL always gives the same bytes.
 
-#include "core/EventList.h"
-#include "core/Framerate.h"
-#include "core/FramerateProvider.h"
-#include "core/Timecode.h"
+#include "core/edl/EventList.h"
+#include "core/time/Framerate.h"
+#include "core/time/FramerateProvider.h"
+#include "core/time/Timecode.h"
 #include "examples/reel3/MixMoves.h"
 #include "examples/reel3/ProductionSound.h"
 #include "examples/reel3/ProgrammeTime.h"

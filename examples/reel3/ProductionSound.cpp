@@ -1,9 +1,11 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "examples/reel3/ProductionSound.h"
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
-#include "core/Framerate.h"
-#include "core/Timecode.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/time/Framerate.h"
+#include "core/time/Timecode.h"
 #include "examples/reel3/SoundCues.h"
 
 #include <algorithm>

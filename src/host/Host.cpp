@@ -1,16 +1,18 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "host/Host.h"
 
-#include "core/ChangeContext.h"
-#include "core/DataModel.h"
-#include "core/DataModelCommandCreator.h"
-#include "core/Timecode.h"
-#include "host/AlertWindow.h"
-#include "host/FileBrowserDialog.h"
-#include "host/FirstFailure.h"
-#include "host/FramerateScope.h"
-#include "host/HostFailure.h"
-#include "host/Project.h"
-#include "host/VideoProvider.h"
+#include "core/model/DataModel.h"
+#include "core/model/DataModelCommandCreator.h"
+#include "core/notify/ChangeContext.h"
+#include "core/time/Timecode.h"
+#include "host/border/FirstFailure.h"
+#include "host/border/HostFailure.h"
+#include "host/picture/VideoProvider.h"
+#include "host/project/FramerateScope.h"
+#include "host/project/Project.h"
+#include "host/services/AlertWindow.h"
+#include "host/services/FileBrowserDialog.h"
 #include "util/StringUtil.h"
 
 #include <utility>

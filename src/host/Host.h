@@ -1,13 +1,15 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/CadrelerBase.h"
-#include "core/ChangeContextNotificationBase.h"
-#include "core/EventList.h"
+#include "core/conform/CadrelerBase.h"
+#include "core/edl/EventList.h"
+#include "core/notify/ChangeContextNotificationBase.h"
 #include "core/serialize/ByteArchive.h"
-#include "host/DataModelCommandCreator.h"
-#include "host/StringTranslator.h"
-#include "host/Teardown.h"
-#include "host/Transport.h"
+#include "host/border/Teardown.h"
+#include "host/services/StringTranslator.h"
+#include "host/services/Transport.h"
+#include "host/undo/DataModelCommandCreator.h"
 #include "velmark/Context.h"
 #include "velmark/Counted.h"
 #include "velmark/Editing.h"

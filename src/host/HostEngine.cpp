@@ -1,12 +1,14 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What the engine asks for, carried out on the active project.
 
-#include "core/Cut.h"
-#include "core/CutList.h"
-#include "core/DataModel.h"
-#include "core/ProgressHandlerBase.h"
+#include "core/cut/Cut.h"
+#include "core/cut/CutList.h"
+#include "core/cut/ProgressHandlerBase.h"
+#include "core/model/DataModel.h"
 #include "host/Host.h"
-#include "host/HostFailure.h"
-#include "host/Project.h"
+#include "host/border/HostFailure.h"
+#include "host/project/Project.h"
 #include "util/HostString.h"
 #include "util/StringUtil.h"
 #include "velmark/Media.h"

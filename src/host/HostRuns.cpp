@@ -1,16 +1,18 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Runs and previews: how a request becomes one entry of the host's undo list.
 
-#include "core/ChangeContext.h"
-#include "core/DataModel.h"
-#include "core/EventBase.h"
-#include "host/DataModelEditStep.h"
-#include "host/FirstFailure.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
+#include "core/notify/ChangeContext.h"
 #include "host/Host.h"
-#include "host/HostFailure.h"
-#include "host/PreviewEventsStep.h"
-#include "host/ProgressHandler.h"
-#include "host/Project.h"
-#include "host/VideoProvider.h"
+#include "host/border/FirstFailure.h"
+#include "host/border/HostFailure.h"
+#include "host/picture/VideoProvider.h"
+#include "host/project/Project.h"
+#include "host/services/ProgressHandler.h"
+#include "host/undo/DataModelEditStep.h"
+#include "host/undo/PreviewEventsStep.h"
 #include "util/StringUtil.h"
 #include "velmark/UserInterface.h"
 

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "util/FileReplacement.h"
 
 #include "util/Result.h"
@@ -89,129 +91,129 @@ FileReplacement::FileReplacement(const fs::path& target)
     std::error_code error;
     const fs::file_type type = fs::status(target, error).type();
     if (type == fs::file_type::regular || type == fs::file_type::not_found) {
-        target_ = followLinks(target);
-        if (!target_.has_filename() || (type == fs::file_type::regular && !isWritable(target_)))
+        m_target = followLinks(target);
+        if (!m_target.has_filename() || (type == fs::file_type::regular && !isWritable(m_target)))
             throw Result::FileAccessFailed;
         openBeside();
     } else {
-        descriptor_ = ::open(target.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, ReadableAndWritable);
+        m_descriptor = ::open(target.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, ReadableAndWritable);
     }
-    if (descriptor_ < 0)
+    if (m_descriptor < 0)
         throw Result::FileAccessFailed;
 }
 
 FileReplacement::~FileReplacement()
 {
-    if (descriptor_ >= 0)
-        ::close(descriptor_);
+    if (m_descriptor >= 0)
+        ::close(m_descriptor);
     std::error_code error;
-    if (!unfinished_.empty())
-        fs::remove(unfinished_, error);
-    if (!former_.empty())
-        fs::rename(former_, target_, error);
-    else if (isPlaced_)
-        fs::remove(target_, error);
+    if (!m_unfinished.empty())
+        fs::remove(m_unfinished, error);
+    if (!m_former.empty())
+        fs::rename(m_former, m_target, error);
+    else if (m_isPlaced)
+        fs::remove(m_target, error);
 }
 
 void FileReplacement::openBeside()
 {
-    unfinished_ = unusedNameBeside(target_);
-    descriptor_ = ::open(unfinished_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, ReadableAndWritable);
-    if (descriptor_ < 0) {
-        unfinished_.clear();
+    m_unfinished = unusedNameBeside(m_target);
+    m_descriptor = ::open(m_unfinished.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, ReadableAndWritable);
+    if (m_descriptor < 0) {
+        m_unfinished.clear();
         return;
     }
     std::error_code error;
-    const fs::file_status former = fs::status(target_, error);
+    const fs::file_status former = fs::status(m_target, error);
     if (fs::is_regular_file(former))
-        fs::permissions(unfinished_, former.permissions(), error);
+        fs::permissions(m_unfinished, former.permissions(), error);
 }
 
 void FileReplacement::write(std::string_view text)
 {
-    if (pending_.size() + text.size() < WellFilled) {
-        pending_ += text;
+    if (m_pending.size() + text.size() < WellFilled) {
+        m_pending += text;
     } else {
-        send(std::exchange(pending_, {}));
+        send(std::exchange(m_pending, {}));
         send(text);
     }
-    if (hasFailed_ || descriptor_ < 0)
+    if (m_hasFailed || m_descriptor < 0)
         throw Result::FileAccessFailed;
 }
 
 void FileReplacement::send(std::string_view text)
 {
-    while (!text.empty() && !hasFailed_) {
-        const ssize_t written = ::write(descriptor_, text.data(), text.size());
+    while (!text.empty() && !m_hasFailed) {
+        const ssize_t written = ::write(m_descriptor, text.data(), text.size());
         if (written >= 0)
             text.remove_prefix(static_cast<std::size_t>(written));
         else
-            hasFailed_ = errno != EINTR;
+            m_hasFailed = errno != EINTR;
     }
 }
 
 bool FileReplacement::close()
 {
-    send(std::exchange(pending_, {}));
-    if (!target_.empty() && !hasFailed_)
-        hasFailed_ = !waitForDisk(descriptor_);
-    if (::close(std::exchange(descriptor_, -1)) != 0)
-        hasFailed_ = true;
-    return !hasFailed_;
+    send(std::exchange(m_pending, {}));
+    if (!m_target.empty() && !m_hasFailed)
+        m_hasFailed = !waitForDisk(m_descriptor);
+    if (::close(std::exchange(m_descriptor, -1)) != 0)
+        m_hasFailed = true;
+    return !m_hasFailed;
 }
 
 void FileReplacement::finish()
 {
-    if (descriptor_ >= 0 ? !close() : hasFailed_)
+    if (m_descriptor >= 0 ? !close() : m_hasFailed)
         throw Result::FileAccessFailed;
 }
 
 void FileReplacement::putInPlace()
 {
     finish();
-    if (target_.empty())
+    if (m_target.empty())
         return;
     std::error_code error;
-    if (fs::is_regular_file(target_, error)) {
+    if (fs::is_regular_file(m_target, error)) {
         // By a second name the former file stays in its place until the new one takes it. Some disks know no such names.
-        const fs::path aside = unusedNameBeside(target_);
-        fs::create_hard_link(target_, aside, error);
+        const fs::path aside = unusedNameBeside(m_target);
+        fs::create_hard_link(m_target, aside, error);
         if (error)
-            fs::rename(target_, aside, error);
+            fs::rename(m_target, aside, error);
         if (error)
             throw Result::FileAccessFailed;
-        former_ = aside;
+        m_former = aside;
     }
     moveToTarget();
-    isPlaced_ = true;
-    syncFolderOf(target_);
+    m_isPlaced = true;
+    syncFolderOf(m_target);
 }
 
 void FileReplacement::keep()
 {
     std::error_code error;
-    if (!former_.empty())
-        fs::remove(former_, error);
-    former_.clear();
-    isPlaced_ = false;
+    if (!m_former.empty())
+        fs::remove(m_former, error);
+    m_former.clear();
+    m_isPlaced = false;
 }
 
 void FileReplacement::commit()
 {
     finish();
-    if (target_.empty())
+    if (m_target.empty())
         return;
     moveToTarget();
-    syncFolderOf(target_);
+    syncFolderOf(m_target);
 }
 
 void FileReplacement::moveToTarget()
 {
     std::error_code error;
-    fs::rename(unfinished_, target_, error);
+    fs::rename(m_unfinished, m_target, error);
     if (error)
         throw Result::FileAccessFailed;
-    unfinished_.clear();
+    m_unfinished.clear();
 }
 
 } // namespace cadrel::util

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <filesystem>
@@ -50,13 +52,13 @@ private:
     bool close();
     void moveToTarget();
 
-    std::filesystem::path target_;     ///< with symbolic links followed; empty when the target is written directly
-    std::filesystem::path unfinished_; ///< empty when there is none (any more)
-    std::filesystem::path former_;     ///< the former file while it stands aside, else empty
-    bool isPlaced_ = false;            ///< in the place of the target, but not kept yet
-    int descriptor_ = -1;              ///< of the file that is written; -1 when none is open
-    bool hasFailed_ = false;           ///< something of the content is lost
-    std::string pending_;              ///< content that is handed to the system with what follows
+    std::filesystem::path m_target;     ///< with symbolic links followed; empty when the target is written directly
+    std::filesystem::path m_unfinished; ///< empty when there is none (any more)
+    std::filesystem::path m_former;     ///< the former file while it stands aside, else empty
+    bool m_isPlaced = false;            ///< in the place of the target, but not kept yet
+    int m_descriptor = -1;              ///< of the file that is written; -1 when none is open
+    bool m_hasFailed = false;           ///< something of the content is lost
+    std::string m_pending;              ///< content that is handed to the system with what follows
 };
 
 } // namespace cadrel::util

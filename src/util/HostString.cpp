@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "util/HostString.h"
 
 #include <optional>
@@ -74,24 +76,24 @@ std::optional<std::wstring> toWide(std::u16string_view utf16)
 
 } // namespace
 
-HostString::HostString(std::wstring_view wide) : length_(0), wide_(wide)
+HostString::HostString(std::wstring_view wide) : m_length(0), m_wide(wide)
 {
     if (!wide.empty()) {
-        utf16_ = toUtf16(wide).value_or(u"<StrErr_2>");
-        if (utf16_.empty())
-            utf16_ = u"<StrErr_1>";
+        m_utf16 = toUtf16(wide).value_or(u"<StrErr_2>");
+        if (m_utf16.empty())
+            m_utf16 = u"<StrErr_1>";
     }
-    length_ = utf16_.size();
+    m_length = m_utf16.size();
 }
 
-HostString::HostString(std::u16string_view utf16) : length_(0), utf16_(utf16)
+HostString::HostString(std::u16string_view utf16) : m_length(0), m_utf16(utf16)
 {
     if (!utf16.empty()) {
-        wide_ = toWide(utf16).value_or(L"<StrErr_4>");
-        if (wide_.empty())
-            wide_ = L"<StrErr_3>";
+        m_wide = toWide(utf16).value_or(L"<StrErr_4>");
+        if (m_wide.empty())
+            m_wide = L"<StrErr_3>";
     }
-    length_ = wide_.size();
+    m_length = m_wide.size();
 }
 
 } // namespace cadrel::util

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <cstddef>
@@ -18,15 +20,15 @@ public:
     explicit HostString(std::u16string_view utf16);
 
     /// The units of the form that was made, without the zero unit.
-    std::size_t length() const { return length_; }
+    std::size_t length() const { return m_length; }
     /// Both forms end with a zero unit.
-    const char16_t* utf16() const { return utf16_.c_str(); }
-    const wchar_t* wide() const { return wide_.c_str(); }
+    const char16_t* utf16() const { return m_utf16.c_str(); }
+    const wchar_t* wide() const { return m_wide.c_str(); }
 
 private:
-    std::size_t length_;
-    std::u16string utf16_;
-    std::wstring wide_;
+    std::size_t m_length;
+    std::u16string m_utf16;
+    std::wstring m_wide;
 };
 
 } // namespace cadrel::util

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <set>
@@ -9,22 +11,22 @@ namespace cadrel::util {
 template <class Listener>
 class ListenerSet {
 public:
-    void add(Listener* listener) { listeners_.insert(listener); }
-    void remove(Listener* listener) { listeners_.erase(listener); }
+    void add(Listener* listener) { m_listeners.insert(listener); }
+    void remove(Listener* listener) { m_listeners.erase(listener); }
 
     /// `tell` is called with each listener in turn.
     template <class Tell>
     void forEach(Tell&& tell) const
     {
-        for (auto next = listeners_.begin(); next != listeners_.end();) {
+        for (auto next = m_listeners.begin(); next != m_listeners.end();) {
             Listener* const listener = *next;
             tell(*listener);
-            next = listeners_.upper_bound(listener);
+            next = m_listeners.upper_bound(listener);
         }
     }
 
 private:
-    std::set<Listener*> listeners_;
+    std::set<Listener*> m_listeners;
 };
 
 } // namespace cadrel::util

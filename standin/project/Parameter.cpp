@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "standin/project/Parameter.h"
 
 #include "standin/project/Project.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/SoundProject.h"
@@ -43,7 +45,7 @@ class Scene {
 public:
     explicit Scene(Origin origin = Origin::AtTheFilm)
         : oldFile(folder.write("old.edl", oldCut())), newFile(folder.write("new.edl", newCut())),
-          film_(origin == Origin::AtTheFilm ? 0.0 : 3600.0)
+          m_film(origin == Origin::AtTheFilm ? 0.0 : 3600.0)
     {
         project = folder.write("scene.stage", text());
     }
@@ -69,7 +71,7 @@ public:
     std::string project;
 
 private:
-    std::string at(double seconds) const { return number(film_ + seconds); }
+    std::string at(double seconds) const { return number(m_film + seconds); }
     std::string clip(const std::string& name, double start, double end, int file = 1) const
     {
         return R"({"kind": "clip", "start": )" + at(start) + R"(, "end": )" + at(end) + R"(, "clip": )" +
@@ -83,7 +85,7 @@ private:
     {
         return R"({"format": "stage", "version": 1, "framesPerSecond": 24, "dropFrame": false, "pulledDown": false,
           "timeOrigin": )" +
-               number(3600.0 - film_) + R"(, "end": )" + at(60) + R"(, "position": 0, "leftLocator": 0,
+               number(3600.0 - m_film) + R"(, "end": )" + at(60) + R"(, "position": 0, "leftLocator": 0,
           "rightLocator": 0, "cycleStart": 0, "cycleEnd": 0,
           "pool": [
             {"number": 1, "kind": "audio", "name": "boom", "path": "boom.wav", "length": 100},
@@ -111,7 +113,7 @@ private:
           ]})";
     }
 
-    double film_;
+    double m_film;
 };
 
 /// Seconds behind 01:00:00:00 of a timecode of that hour, at 24 frames a second.

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "tests/app/ProgramRun.h"
 
 #include <algorithm>
@@ -24,21 +26,21 @@ class Outputs {
 public:
     Outputs()
     {
-        posix_spawn_file_actions_init(&actions_);
-        posix_spawn_file_actions_addopen(&actions_, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
+        posix_spawn_file_actions_init(&m_actions);
+        posix_spawn_file_actions_addopen(&m_actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
     }
     Outputs(const Outputs&) = delete;
     Outputs& operator=(const Outputs&) = delete;
-    ~Outputs() { posix_spawn_file_actions_destroy(&actions_); }
+    ~Outputs() { posix_spawn_file_actions_destroy(&m_actions); }
 
     void open(int descriptor, const std::string& path)
     {
-        posix_spawn_file_actions_addopen(&actions_, descriptor, path.c_str(), O_WRONLY | O_CREAT | O_NOCTTY, 0600);
+        posix_spawn_file_actions_addopen(&m_actions, descriptor, path.c_str(), O_WRONLY | O_CREAT | O_NOCTTY, 0600);
     }
-    const posix_spawn_file_actions_t* actions() const { return &actions_; }
+    const posix_spawn_file_actions_t* actions() const { return &m_actions; }
 
 private:
-    posix_spawn_file_actions_t actions_{};
+    posix_spawn_file_actions_t m_actions{};
 };
 
 std::vector<char*> pointersTo(std::vector<std::string>& words)

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "tests/app/ProgramRun.h"
 
 #include <algorithm>
@@ -26,11 +28,11 @@ json jsonOf(std::vector<std::string> arguments)
 /// The tracks of the sound project, and what the tests ask of them.
 class Reel3Sound : public testing::Test {
 protected:
-    const json& project() const { return project_; }
+    const json& project() const { return m_project; }
 
     const json& track(const std::string& name) const
     {
-        const json& tracks = project_.at("tracks");
+        const json& tracks = m_project.at("tracks");
         return *std::find_if(tracks.begin(), tracks.end(),
                              [&name](const json& track) { return track["name"] == name; });
     }
@@ -39,7 +41,7 @@ protected:
     std::vector<json> soundClips() const
     {
         std::vector<json> clips;
-        for (const json& track : project_.at("tracks")) {
+        for (const json& track : m_project.at("tracks")) {
             if (track.at("kind") == "audio" && !track.at("locked"))
                 appendClips(track, clips);
         }
@@ -72,7 +74,7 @@ private:
         }
     }
 
-    const json project_ = jsonOf({"show", Reel3 + "reel3.stage"});
+    const json m_project = jsonOf({"show", Reel3 + "reel3.stage"});
 };
 
 double frameOf(const json& time)

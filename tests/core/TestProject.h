@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/FramerateProvider.h"
-#include "core/Timecode.h"
+#include "core/time/FramerateProvider.h"
+#include "core/time/Timecode.h"
 #include "tests/util/PlainConverter.h"
 #include "util/StringUtil.h"
 

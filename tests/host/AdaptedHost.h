@@ -1,12 +1,14 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/DataModel.h"
-#include "host/DataModelEditStep.h"
+#include "core/model/DataModel.h"
 #include "host/Host.h"
+#include "host/undo/DataModelEditStep.h"
 #include "standin/edit/EditService.h"
 #include "standin/project/Project.h"
-#include "tests/core/EventMaking.h"
-#include "tests/core/RecordingListener.h"
+#include "tests/core/edl/EventMaking.h"
+#include "tests/core/notify/RecordingListener.h"
 #include "tests/host/AlteredContext.h"
 #include "tests/standin/TestHost.h"
 #include "velmark/String.h"

@@ -1,13 +1,15 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Runs and previews in a host of which one call fails, whichever it is.
 
 #include "host/Host.h"
-#include "host/TrackRole.h"
+#include "host/track/TrackRole.h"
 #include "standin/project/Track.h"
 #include "standin/services/IdleManager.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AdaptedHost.h"
 #include "tests/host/FailingHost.h"
-#include "tests/host/WatchedProgress.h"
+#include "tests/host/services/WatchedProgress.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>

@@ -1,16 +1,18 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What the host tells the adapter: projects that come and go, are saved and edited.
 
-#include "core/CadrelerBase.h"
-#include "core/DataModelCommandCreator.h"
-#include "core/MediaPoolInterface.h"
-#include "core/Timecode.h"
-#include "gui/AlertWindowBase.h"
-#include "gui/FileBrowserDialogBase.h"
+#include "core/conform/CadrelerBase.h"
+#include "core/model/DataModelCommandCreator.h"
+#include "core/model/MediaPoolInterface.h"
+#include "core/time/Timecode.h"
+#include "gui/services/AlertWindowBase.h"
+#include "gui/services/FileBrowserDialogBase.h"
 #include "host/Host.h"
-#include "host/Project.h"
-#include "host/VideoProvider.h"
-#include "tests/core/RecordingListener.h"
+#include "host/picture/VideoProvider.h"
+#include "host/project/Project.h"
 #include "tests/core/ThrownResult.h"
+#include "tests/core/notify/RecordingListener.h"
 #include "tests/host/AdaptedHost.h"
 #include "util/StringUtil.h"
 #include "velmark/Attributes.h"

@@ -1,16 +1,18 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What the window and the engine ask of the adapter, one by one.
 
-#include "core/Cut.h"
-#include "core/CutList.h"
-#include "core/DataModelCommandCreator.h"
-#include "core/MediaPoolInterface.h"
+#include "core/cut/Cut.h"
+#include "core/cut/CutList.h"
+#include "core/model/DataModelCommandCreator.h"
+#include "core/model/MediaPoolInterface.h"
 #include "host/Host.h"
-#include "host/Project.h"
-#include "host/TrackRole.h"
-#include "host/VideoProvider.h"
+#include "host/picture/VideoProvider.h"
+#include "host/project/Project.h"
+#include "host/track/TrackRole.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AdaptedHost.h"
-#include "tests/host/FakeProject.h"
+#include "tests/host/track/FakeProject.h"
 #include "velmark/Attributes.h"
 #include "velmark/Tracks.h"
 

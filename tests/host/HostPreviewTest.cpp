@@ -1,16 +1,18 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // A preview from its request to its end, and what the user does meanwhile.
 
-#include "core/ChangeContext.h"
+#include "core/notify/ChangeContext.h"
 #include "host/Host.h"
-#include "host/PreviewEventsStep.h"
-#include "host/Project.h"
-#include "host/TrackRole.h"
-#include "tests/core/RecordingListener.h"
+#include "host/project/Project.h"
+#include "host/track/TrackRole.h"
+#include "host/undo/PreviewEventsStep.h"
 #include "tests/core/ThrownResult.h"
+#include "tests/core/notify/RecordingListener.h"
 #include "tests/host/AdaptedHost.h"
-#include "tests/host/AlteredEdits.h"
-#include "tests/host/HostedModel.h"
-#include "tests/host/WatchedProgress.h"
+#include "tests/host/project/AlteredEdits.h"
+#include "tests/host/services/WatchedProgress.h"
+#include "tests/host/undo/HostedModel.h"
 #include "velmark/Attributes.h"
 #include "velmark/Tracks.h"
 

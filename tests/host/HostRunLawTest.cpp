@@ -1,12 +1,14 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // The law of a run, for random projects and films: where a change event lies, each track holds what stood at the source of
 // the instant, and elsewhere nothing; what is no part of the run stays as it was.
 
-#include "core/DataModel.h"
-#include "core/EventBase.h"
-#include "core/SecondsRange.h"
-#include "core/Timecode.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
+#include "core/time/SecondsRange.h"
+#include "core/time/Timecode.h"
 #include "host/Host.h"
-#include "host/TrackRole.h"
+#include "host/track/TrackRole.h"
 #include "standin/Application.h"
 #include "standin/ProjectManager.h"
 #include "standin/edit/EditService.h"

@@ -1,14 +1,16 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // A run from its request to the undo list, on the tracks of a project.
 
-#include "core/ChangeContext.h"
-#include "core/Cut.h"
+#include "core/cut/Cut.h"
+#include "core/notify/ChangeContext.h"
 #include "host/Host.h"
-#include "host/Project.h"
-#include "host/TrackRole.h"
+#include "host/project/Project.h"
+#include "host/track/TrackRole.h"
 #include "standin/services/IdleManager.h"
-#include "tests/core/RecordingListener.h"
+#include "tests/core/notify/RecordingListener.h"
 #include "tests/host/AdaptedHost.h"
-#include "tests/host/WatchedProgress.h"
+#include "tests/host/services/WatchedProgress.h"
 #include "tests/standin/TestHost.h"
 #include "velmark/Transport.h"
 

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Laws of undo for random projects and random edits, made through the interfaces as a module makes them.
 
 #include "tests/standin/RandomProject.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What the file of a large project costs. A step that is quadratic in clips would take sixteen times as long for four times
 // as many.
 

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Files that are no projects. Each fault is one line that names the file, the place in it and what is wrong there.
 
 #include "standin/file/ProjectFile.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // What holds for every project and its file.
 
 #include "standin/file/ProjectFile.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // The page that describes the project file.
 
 #include "standin/file/ProjectKeys.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 // Saving when something goes wrong: whatever happens, and whenever, there is all of the former file or all of the new one.
 
 #include "standin/file/ProjectFile.h"

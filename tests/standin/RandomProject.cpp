@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "tests/standin/RandomProject.h"
 
 #include "standin/file/ProjectKeys.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "standin/ProjectManager.h"
 #include "standin/edit/EditService.h"
 #include "standin/file/ProjectFile.h"

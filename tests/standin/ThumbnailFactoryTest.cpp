@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "standin/services/ThumbnailFactory.h"
 
 #include "standin/services/BitmapFont.h"

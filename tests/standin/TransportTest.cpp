@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "standin/services/Transport.h"
 
 #include "tests/standin/TestHost.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <cerrno>
@@ -69,10 +71,10 @@ public:
         ChildProcess child(action, true);
         child.wait();
         // Or the system doesn't tell a call from a signal.
-        ptrace(PTRACE_SETOPTIONS, child.id_, nullptr, PTRACE_O_TRACESYSGOOD);
+        ptrace(PTRACE_SETOPTIONS, child.m_id, nullptr, PTRACE_O_TRACESYSGOOD);
         bool isRenaming = false;
         for (int crossing = 1; child.isRunning(); ++crossing) {
-            ptrace(PTRACE_SYSCALL, child.id_, nullptr, nullptr);
+            ptrace(PTRACE_SYSCALL, child.m_id, nullptr, nullptr);
             child.wait();
             if (!child.isRunning())
                 break;
@@ -82,7 +84,7 @@ public:
             else if (call.op == PTRACE_SYSCALL_INFO_EXIT)
                 progress.hasRenamed = progress.hasRenamed || (isRenaming && !call.exit.is_error);
             if (crossing == step) {
-                kill(child.id_, SIGKILL);
+                kill(child.m_id, SIGKILL);
                 child.wait();
                 return progress;
             }
@@ -93,11 +95,11 @@ public:
 
 private:
     template <class Action>
-    ChildProcess(Action action, bool isTraced) : id_(fork())
+    ChildProcess(Action action, bool isTraced) : m_id(fork())
     {
-        if (id_ < 0)
+        if (m_id < 0)
             throw std::runtime_error("can't make a process");
-        if (id_ > 0)
+        if (m_id > 0)
             return;
         constexpr int Failed = 99;
         try {
@@ -122,27 +124,27 @@ private:
     __ptrace_syscall_info currentCall() const
     {
         __ptrace_syscall_info call{};
-        if (ptrace(PTRACE_GET_SYSCALL_INFO, id_, sizeof call, &call) <= 0)
+        if (ptrace(PTRACE_GET_SYSCALL_INFO, m_id, sizeof call, &call) <= 0)
             throw std::runtime_error("the system doesn't tell what a process calls");
         return call;
     }
 
     void wait()
     {
-        if (waitpid(id_, &state_, 0) != id_)
+        if (waitpid(m_id, &m_state, 0) != m_id)
             throw std::runtime_error("a process has gone astray");
     }
     bool isRunning() const
     {
-        return WIFSTOPPED(state_);
+        return WIFSTOPPED(m_state);
     }
     int status() const
     {
-        return WIFEXITED(state_) ? WEXITSTATUS(state_) : -1;
+        return WIFEXITED(m_state) ? WEXITSTATUS(m_state) : -1;
     }
 
-    pid_t id_;
-    int state_ = 0x7f; // stopped, as far as is known
+    pid_t m_id;
+    int m_state = 0x7f; // stopped, as far as is known
 };
 
 } // namespace cadrel::tests

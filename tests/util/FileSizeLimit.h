@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <csignal>
@@ -8,10 +10,10 @@ namespace cadrel::tests {
 /// Stands in for a full disk while it lives: no regular file can grow beyond `bytes`.
 class FileSizeLimit {
 public:
-    explicit FileSizeLimit(rlim_t bytes) : formerHandler_(std::signal(SIGXFSZ, SIG_IGN))
+    explicit FileSizeLimit(rlim_t bytes) : m_formerHandler(std::signal(SIGXFSZ, SIG_IGN))
     {
-        getrlimit(RLIMIT_FSIZE, &former_);
-        rlimit limit = former_;
+        getrlimit(RLIMIT_FSIZE, &m_former);
+        rlimit limit = m_former;
         limit.rlim_cur = bytes;
         setrlimit(RLIMIT_FSIZE, &limit);
     }
@@ -19,13 +21,13 @@ public:
     FileSizeLimit& operator=(const FileSizeLimit&) = delete;
     ~FileSizeLimit()
     {
-        setrlimit(RLIMIT_FSIZE, &former_);
-        std::signal(SIGXFSZ, formerHandler_);
+        setrlimit(RLIMIT_FSIZE, &m_former);
+        std::signal(SIGXFSZ, m_formerHandler);
     }
 
 private:
-    void (*formerHandler_)(int);
-    rlimit former_{};
+    void (*m_formerHandler)(int);
+    rlimit m_former{};
 };
 
 } // namespace cadrel::tests

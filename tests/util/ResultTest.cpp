@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "util/Result.h"
 
 #include "tests/core/ThrownResult.h"

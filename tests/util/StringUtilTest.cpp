@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "util/StringUtil.h"
 
 #include "tests/core/ThrownResult.h"
@@ -28,11 +30,11 @@ public:
 
 class StringUtilWithConverter : public testing::Test {
 protected:
-    StringUtilWithConverter() { StringUtil::setConverter(&converter_); }
+    StringUtilWithConverter() { StringUtil::setConverter(&m_converter); }
     ~StringUtilWithConverter() override { StringUtil::setConverter(nullptr); }
 
 private:
-    ShoutingConverter converter_;
+    ShoutingConverter m_converter;
 };
 
 class StringUtilRemoveFile : public StringUtilWithConverter {

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include "tests/util/PlainConverter.h"
@@ -46,38 +48,38 @@ public:
         std::string name = (std::filesystem::temp_directory_path() / "cadrel-test-XXXXXX").string();
         if (mkdtemp(name.data()) == nullptr)
             throw std::runtime_error("can't make a temporary folder");
-        path_ = name;
+        m_path = name;
     }
     TempFolder(const TempFolder&) = delete;
     TempFolder& operator=(const TempFolder&) = delete;
     ~TempFolder()
     {
         std::error_code ignored;
-        std::filesystem::remove_all(path_, ignored);
+        std::filesystem::remove_all(m_path, ignored);
     }
 
-    const std::filesystem::path& path() const { return path_; }
-    std::filesystem::path operator/(const std::string& name) const { return path_ / name; }
+    const std::filesystem::path& path() const { return m_path; }
+    std::filesystem::path operator/(const std::string& name) const { return m_path / name; }
 
     /// Writes a file into it and returns its path.
     std::filesystem::path write(const std::string& name, std::string_view content) const
     {
-        writeFile(path_ / name, content);
-        return path_ / name;
+        writeFile(m_path / name, content);
+        return m_path / name;
     }
 
     /// The names of everything in it, sorted.
     std::vector<std::string> names() const
     {
         std::vector<std::string> names;
-        for (const auto& entry : std::filesystem::directory_iterator(path_))
+        for (const auto& entry : std::filesystem::directory_iterator(m_path))
             names.push_back(entry.path().filename().string());
         std::sort(names.begin(), names.end());
         return names;
     }
 
 private:
-    std::filesystem::path path_;
+    std::filesystem::path m_path;
 };
 
 } // namespace cadrel::tests

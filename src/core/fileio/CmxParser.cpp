@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/fileio/CmxParser.h"
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "core/fileio/EventLine.h"
 #include "core/fileio/LineReader.h"
 #include "util/FilePath.h"
@@ -79,54 +81,54 @@ public:
     /// The event that the next line is read into.
     EventBase& begin()
     {
-        if (isPending_) {
-            close(previous_);
-            std::swap(previous_, current_);
-            events_.push_back(previous_.event);
+        if (m_isPending) {
+            close(m_previous);
+            std::swap(m_previous, m_current);
+            m_events.push_back(m_previous.event);
         }
-        current_.event = std::make_shared<EventBase>();
-        isPending_ = false;
-        return *current_.event;
+        m_current.event = std::make_shared<EventBase>();
+        m_isPending = false;
+        return *m_current.event;
     }
 
     /// Takes the event that was begun into the list.
     void accept(std::string_view line)
     {
-        current_.comment = line;
-        isPending_ = true;
+        m_current.comment = line;
+        m_isPending = true;
     }
 
     void addComment(std::string_view line)
     {
-        if (!isPending_)
+        if (!m_isPending)
             return;
-        if (previous_.event->eventNumber() != current_.event->eventNumber())
-            current_.applyComment(line);
+        if (m_previous.event->eventNumber() != m_current.event->eventNumber())
+            m_current.applyComment(line);
         else if (contains(line, "FROM CLIP"))
-            previous_.applyComment(line);
+            m_previous.applyComment(line);
         else if (contains(line, "TO CLIP"))
-            current_.applyComment(line);
+            m_current.applyComment(line);
     }
 
     /// All events of the file, which has ended.
     std::vector<std::shared_ptr<EventBase>> end()
     {
-        close(previous_);
-        if (isPending_) {
-            close(current_);
-            events_.push_back(current_.event);
+        close(m_previous);
+        if (m_isPending) {
+            close(m_current);
+            m_events.push_back(m_current.event);
         }
-        return std::move(events_);
+        return std::move(m_events);
     }
 
 private:
     static void close(const OpenEvent& open) { open.event->setComment(open.comment); }
 
     // The first event of a file has no previous one; an event outside the list, of number 0, stands in for it.
-    OpenEvent previous_;
-    OpenEvent current_;
-    bool isPending_ = false;
-    std::vector<std::shared_ptr<EventBase>> events_;
+    OpenEvent m_previous;
+    OpenEvent m_current;
+    bool m_isPending = false;
+    std::vector<std::shared_ptr<EventBase>> m_events;
 };
 
 } // namespace
@@ -169,18 +171,18 @@ try {
 
 Framerate CmxParser::detectedFramerate() const
 {
-    if (dropFrameState_ == 1)
+    if (m_dropFrameState == 1)
         return {30, 1};
-    std::size_t highest = frameHistogram_.size() - 1;
-    while (highest > 0 && frameHistogram_[highest] == 0)
+    std::size_t highest = m_frameHistogram.size() - 1;
+    while (highest > 0 && m_frameHistogram[highest] == 0)
         --highest;
     if (highest == 0)
-        return {0, dropFrameState_};
+        return {0, m_dropFrameState};
     for (const std::int32_t rate : {24, 25, 30}) {
         if (highest < static_cast<std::size_t>(rate))
-            return {rate, dropFrameState_};
+            return {rate, m_dropFrameState};
     }
-    return {60, dropFrameState_};
+    return {60, m_dropFrameState};
 }
 
 /// Calls one of the two for each event line and each comment line, and looks at the frame-count mode.
@@ -188,7 +190,7 @@ template <class EventLineAction, class CommentAction>
 void CmxParser::readLines(const std::wstring& path, EventLineAction onEventLine, CommentAction onComment)
 {
     LineReader reader(util::toFilePath(path));
-    dropFrameState_ = -1;
+    m_dropFrameState = -1;
     while (const std::optional<std::string_view> line = reader.next()) {
         if (line->empty())
             continue;
@@ -204,9 +206,9 @@ void CmxParser::readLines(const std::wstring& path, EventLineAction onEventLine,
 void CmxParser::readFrameCountMode(std::string_view line)
 {
     if (contains(line, "NON-DROP FRAME"))
-        dropFrameState_ = 0;
+        m_dropFrameState = 0;
     else if (contains(line, "DROP FRAME"))
-        dropFrameState_ = 1;
+        m_dropFrameState = 1;
 }
 
 /// False for a line that makes no event, for want of columns or of a provider for the timecodes.
@@ -259,8 +261,8 @@ std::optional<Timecode> CmxParser::parseTimecode(std::string_view column)
     const std::optional<Timecode> timecode = Timecode::parse(column);
     if (timecode) {
         const auto frames = static_cast<std::size_t>(timecode->frames());
-        if (frames < frameHistogram_.size() && frameHistogram_[frames] < std::numeric_limits<std::int32_t>::max())
-            ++frameHistogram_[frames];
+        if (frames < m_frameHistogram.size() && m_frameHistogram[frames] < std::numeric_limits<std::int32_t>::max())
+            ++m_frameHistogram[frames];
     }
     return timecode;
 }

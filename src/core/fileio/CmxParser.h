@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/Timecode.h"
 #include "core/fileio/ParserInterface.h"
+#include "core/time/Timecode.h"
 
 #include <array>
 #include <cstdint>
@@ -49,8 +51,8 @@ private:
     bool parseEventLine(std::string_view line, bool acceptAudio, EventBase& event);
     std::optional<Timecode> parseTimecode(std::string_view column);
 
-    std::int32_t dropFrameState_ = -1; ///< 0 non-drop, 1 drop-frame
-    std::array<std::int32_t, 60> frameHistogram_{};
+    std::int32_t m_dropFrameState = -1; ///< 0 non-drop, 1 drop-frame
+    std::array<std::int32_t, 60> m_frameHistogram{};
 };
 
 } // namespace cadrel::core::fileio

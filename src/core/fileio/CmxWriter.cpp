@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/fileio/CmxWriter.h"
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "util/FilePath.h"
 #include "util/FileReplacement.h"
 #include "util/StringUtil.h"

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/fileio/LineReader.h"
 
 #include "util/Result.h"
@@ -17,15 +19,15 @@ constexpr std::size_t ChunkSize = 256 * 1024;
 
 } // namespace
 
-LineReader::LineReader(const std::filesystem::path& file) : buffer_(ChunkSize, '\0')
+LineReader::LineReader(const std::filesystem::path& file) : m_buffer(ChunkSize, '\0')
 {
     std::error_code error;
     if (!std::filesystem::is_regular_file(file, error))
         throw Result::FileAccessFailed;
     // The chunks are read straight into the own buffer.
-    stream_.rdbuf()->pubsetbuf(nullptr, 0);
-    stream_.open(file, std::ios::binary);
-    if (!stream_.is_open())
+    m_stream.rdbuf()->pubsetbuf(nullptr, 0);
+    m_stream.open(file, std::ios::binary);
+    if (!m_stream.is_open())
         throw Result::FileAccessFailed;
     findDelimiter();
 }
@@ -34,10 +36,10 @@ std::optional<std::string_view> LineReader::next()
 {
     std::size_t searched = 0;
     for (;;) {
-        const std::size_t length = unread().find(delimiter_, searched);
+        const std::size_t length = unread().find(m_delimiter, searched);
         if (length != std::string_view::npos) {
             const std::string_view line = unread().substr(0, length);
-            begin_ += length + 1;
+            m_begin += length + 1;
             return StringUtil::trimView(line);
         }
         searched = unread().size();
@@ -47,7 +49,7 @@ std::optional<std::string_view> LineReader::next()
     if (unread().empty())
         return std::nullopt;
     const std::string_view line = unread();
-    begin_ = end_;
+    m_begin = m_end;
     return StringUtil::trimView(line);
 }
 
@@ -58,7 +60,7 @@ void LineReader::findDelimiter()
         const std::size_t carriageReturn = unread().find('\r', searched);
         const std::size_t lineFeed = unread().find('\n', searched);
         if (carriageReturn != lineFeed) {
-            delimiter_ = carriageReturn < lineFeed ? '\r' : '\n';
+            m_delimiter = carriageReturn < lineFeed ? '\r' : '\n';
             return;
         }
         searched = unread().size();
@@ -68,19 +70,19 @@ void LineReader::findDelimiter()
 /// Adds a part of the file to the unread text; false at the end of the file.
 bool LineReader::readMore()
 {
-    if (begin_ > 0) {
-        std::copy(unread().begin(), unread().end(), buffer_.begin());
-        end_ -= begin_;
-        begin_ = 0;
+    if (m_begin > 0) {
+        std::copy(unread().begin(), unread().end(), m_buffer.begin());
+        m_end -= m_begin;
+        m_begin = 0;
     }
     // Doubling keeps the time for a line of any length linear.
-    if (end_ == buffer_.size())
-        buffer_.resize(2 * buffer_.size());
-    stream_.read(&buffer_[end_], static_cast<std::streamsize>(buffer_.size() - end_));
-    if (stream_.bad())
+    if (m_end == m_buffer.size())
+        m_buffer.resize(2 * m_buffer.size());
+    m_stream.read(&m_buffer[m_end], static_cast<std::streamsize>(m_buffer.size() - m_end));
+    if (m_stream.bad())
         throw Result::FileAccessFailed;
-    const auto count = static_cast<std::size_t>(stream_.gcount());
-    end_ += count;
+    const auto count = static_cast<std::size_t>(m_stream.gcount());
+    m_end += count;
     return count > 0;
 }
 

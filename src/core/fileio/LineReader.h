@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <cstddef>
@@ -23,13 +25,13 @@ public:
 private:
     void findDelimiter();
     bool readMore();
-    std::string_view unread() const { return std::string_view(buffer_).substr(begin_, end_ - begin_); }
+    std::string_view unread() const { return std::string_view(m_buffer).substr(m_begin, m_end - m_begin); }
 
-    std::ifstream stream_;
-    std::string buffer_;
-    std::size_t begin_ = 0; ///< what has been read from the file and not given out stands from here
-    std::size_t end_ = 0;   ///< to here
-    char delimiter_ = '\n';
+    std::ifstream m_stream;
+    std::string m_buffer;
+    std::size_t m_begin = 0; ///< what has been read from the file and not given out stands from here
+    std::size_t m_end = 0;   ///< to here
+    char m_delimiter = '\n';
 };
 
 } // namespace cadrel::core::fileio

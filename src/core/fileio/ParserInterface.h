@@ -1,6 +1,8 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/Framerate.h"
+#include "core/time/Framerate.h"
 #include "util/Result.h"
 
 #include <string>

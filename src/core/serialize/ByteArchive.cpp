@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/serialize/ByteArchive.h"
 
 #include "core/serialize/Serializable.h"
@@ -29,28 +31,28 @@ constexpr std::array<std::uint32_t, 256> makeCrcTable()
 
 void ByteArchive::clear()
 {
-    bytes_.clear();
-    readPosition_ = 0;
+    m_bytes.clear();
+    m_readPosition = 0;
 }
 
 void ByteArchive::rewind()
 {
-    readPosition_ = 0;
+    m_readPosition = 0;
 }
 
 void ByteArchive::assign(const std::uint8_t* bytes, std::size_t size)
 {
-    bytes_ = size == 0 ? std::vector<std::uint8_t>() : std::vector<std::uint8_t>(bytes, bytes + size);
-    readPosition_ = 0;
+    m_bytes = size == 0 ? std::vector<std::uint8_t>() : std::vector<std::uint8_t>(bytes, bytes + size);
+    m_readPosition = 0;
 }
 
 std::uint32_t ByteArchive::crc32() const
 {
     static constexpr auto Table = makeCrcTable();
-    if (bytes_.empty())
+    if (m_bytes.empty())
         return 0;
     std::uint32_t crc = 0xFFFFFFFFU;
-    for (const std::uint8_t byte : bytes_)
+    for (const std::uint8_t byte : m_bytes)
         crc = Table[(crc ^ byte) & 0xFFU] ^ (crc >> 8U);
     return ~crc;
 }
@@ -64,7 +66,7 @@ void ByteArchive::ensureBytes(std::size_t count) const
 void ByteArchive::appendBytes(std::uint64_t value, std::size_t byteCount)
 {
     for (std::size_t index = 0; index < byteCount; ++index)
-        bytes_.push_back(static_cast<std::uint8_t>(value >> (8 * index)));
+        m_bytes.push_back(static_cast<std::uint8_t>(value >> (8 * index)));
 }
 
 std::uint64_t ByteArchive::takeBytes(std::size_t byteCount)
@@ -72,20 +74,20 @@ std::uint64_t ByteArchive::takeBytes(std::size_t byteCount)
     ensureBytes(byteCount);
     std::uint64_t value = 0;
     for (std::size_t index = 0; index < byteCount; ++index)
-        value |= static_cast<std::uint64_t>(bytes_[readPosition_ + index]) << (8 * index);
-    readPosition_ += byteCount;
+        value |= static_cast<std::uint64_t>(m_bytes[m_readPosition + index]) << (8 * index);
+    m_readPosition += byteCount;
     return value;
 }
 
 ByteArchive& ByteArchive::operator<<(std::uint8_t value)
 {
-    bytes_.push_back(value);
+    m_bytes.push_back(value);
     return *this;
 }
 
 ByteArchive& ByteArchive::operator<<(bool value)
 {
-    bytes_.push_back(value ? 1 : 0);
+    m_bytes.push_back(value ? 1 : 0);
     return *this;
 }
 
@@ -114,7 +116,7 @@ ByteArchive& ByteArchive::operator<<(double value)
 ByteArchive& ByteArchive::operator<<(const std::string& text)
 {
     writeCount(text.size());
-    bytes_.insert(bytes_.end(), text.begin(), text.end());
+    m_bytes.insert(m_bytes.end(), text.begin(), text.end());
     return *this;
 }
 
@@ -168,9 +170,9 @@ ByteArchive& ByteArchive::operator>>(std::string& text)
         throw Result::EndOfData;
     const auto length = static_cast<std::size_t>(count);
     ensureBytes(length);
-    const auto first = bytes_.begin() + static_cast<std::ptrdiff_t>(readPosition_);
+    const auto first = m_bytes.begin() + static_cast<std::ptrdiff_t>(m_readPosition);
     text.assign(first, first + count);
-    readPosition_ += length;
+    m_readPosition += length;
     return *this;
 }
 

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <cstddef>
@@ -27,16 +29,16 @@ public:
     void clear();
     /// The next read starts at the first byte.
     void rewind();
-    std::size_t size() const { return bytes_.size(); }
+    std::size_t size() const { return m_bytes.size(); }
     /// Null when empty.
-    const std::uint8_t* data() const { return bytes_.empty() ? nullptr : bytes_.data(); }
+    const std::uint8_t* data() const { return m_bytes.empty() ? nullptr : m_bytes.data(); }
     /// Replaces the content with a copy of `size` bytes; the position is 0 again.
     void assign(const std::uint8_t* bytes, std::size_t size);
 
     /// The CRC-32 of IEEE 802.3 over all bytes; 0 when empty.
     std::uint32_t crc32() const;
 
-    std::size_t bytesLeft() const { return readPosition_ < bytes_.size() ? bytes_.size() - readPosition_ : 0; }
+    std::size_t bytesLeft() const { return m_readPosition < m_bytes.size() ? m_bytes.size() - m_readPosition : 0; }
     bool hasBytes(std::size_t count) const { return count <= bytesLeft(); }
     /// Throws Result::EndOfData when fewer than `count` bytes are left.
     void ensureBytes(std::size_t count) const;
@@ -73,8 +75,8 @@ private:
     void appendBytes(std::uint64_t value, std::size_t byteCount);
     std::uint64_t takeBytes(std::size_t byteCount);
 
-    std::vector<std::uint8_t> bytes_;
-    std::size_t readPosition_ = 0;
+    std::vector<std::uint8_t> m_bytes;
+    std::size_t m_readPosition = 0;
 };
 
 } // namespace cadrel::core::serialize

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/serialize/Serializable.h"
 
 #include "core/serialize/ByteArchive.h"
@@ -14,7 +16,7 @@ void Serializable::readOlder(ByteArchive&, std::uint32_t)
 
 void Serializable::serialize(ByteArchive& archive) const
 {
-    archive << version_;
+    archive << m_version;
     write(archive);
 }
 
@@ -22,9 +24,9 @@ void Serializable::deserialize(ByteArchive& archive)
 {
     std::uint32_t streamVersion = 0;
     archive >> streamVersion;
-    if (streamVersion > version_)
+    if (streamVersion > m_version)
         throw Result::NewerVersion;
-    if (streamVersion == version_)
+    if (streamVersion == m_version)
         readCurrent(archive);
     else
         readOlder(archive, streamVersion);

@@ -1,3 +1,5 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
 #include <cstdint>
@@ -27,16 +29,16 @@ public:
     void deserialize(ByteArchive& archive);
 
     /// The version that the running code writes; reading doesn't change it.
-    std::uint32_t version() const { return version_; }
+    std::uint32_t version() const { return m_version; }
 
 protected:
-    explicit Serializable(std::uint32_t version) : version_(version) {}
+    explicit Serializable(std::uint32_t version) : m_version(version) {}
     Serializable(const Serializable&) = default;
     /// The version belongs to the class, not to the value.
     Serializable& operator=(const Serializable&) { return *this; }
 
 private:
-    std::uint32_t version_;
+    std::uint32_t m_version;
 };
 
 } // namespace cadrel::core::serialize

@@ -1,11 +1,13 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/fileio/CmxParser.h"
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
-#include "tests/core/EventMaking.h"
-#include "tests/core/RecordingListener.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "tests/core/TestProject.h"
+#include "tests/core/edl/EventMaking.h"
 #include "tests/core/fileio/EdlReading.h"
+#include "tests/core/notify/RecordingListener.h"
 #include "tests/util/TempFolder.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
@@ -44,19 +46,19 @@ const std::string Cut = "001 AX V C " + Timecodes;
 /// The one event of a text.
 class OnlyEvent {
 public:
-    explicit OnlyEvent(const std::string& text, bool acceptAudio = false) : reading_(text, acceptAudio)
+    explicit OnlyEvent(const std::string& text, bool acceptAudio = false) : m_reading(text, acceptAudio)
     {
-        EXPECT_EQ(reading_.events.size(), 1U) << text;
-        if (reading_.events.isEmpty())
-            reading_.events.add(std::make_shared<EventBase>());
+        EXPECT_EQ(m_reading.events.size(), 1U) << text;
+        if (m_reading.events.isEmpty())
+            m_reading.events.add(std::make_shared<EventBase>());
     }
 
-    const EventBase* operator->() const { return &reading_.events.at(0); }
-    const EventBase& operator*() const { return reading_.events.at(0); }
-    Flaws flaws() const { return flawsOf(reading_.events.at(0)); }
+    const EventBase* operator->() const { return &m_reading.events.at(0); }
+    const EventBase& operator*() const { return m_reading.events.at(0); }
+    Flaws flaws() const { return flawsOf(m_reading.events.at(0)); }
 
 private:
-    EdlReading reading_;
+    EdlReading m_reading;
 };
 
 std::size_t countOf(const std::string& text)

@@ -1,10 +1,12 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/fileio/CmxWriter.h"
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
-#include "tests/core/EventMaking.h"
 #include "tests/core/TestProject.h"
+#include "tests/core/edl/EventMaking.h"
 #include "tests/util/FileSizeLimit.h"
 #include "tests/util/TempFolder.h"
 #include "util/Result.h"

@@ -1,9 +1,11 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #pragma once
 
-#include "core/EventBase.h"
-#include "core/EventList.h"
-#include "core/Framerate.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
+#include "core/time/Framerate.h"
 #include "tests/util/TempFolder.h"
 #include "util/Result.h"
 

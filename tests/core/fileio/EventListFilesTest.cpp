@@ -1,11 +1,13 @@
-#include "core/EventBase.h"
-#include "core/EventList.h"
-#include "core/Framerate.h"
-#include "tests/core/EventMaking.h"
-#include "tests/core/RecordingListener.h"
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/time/Framerate.h"
 #include "tests/core/TestProject.h"
 #include "tests/core/ThrownResult.h"
+#include "tests/core/edl/EventMaking.h"
 #include "tests/core/fileio/EdlReading.h"
+#include "tests/core/notify/RecordingListener.h"
 #include "tests/util/TempFolder.h"
 #include "util/Result.h"
 

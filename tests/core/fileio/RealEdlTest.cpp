@@ -1,7 +1,9 @@
-#include "core/EventBase.h"
-#include "core/EventList.h"
-#include "core/Framerate.h"
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
+#include "core/time/Framerate.h"
 #include "tests/core/TestProject.h"
 #include "tests/core/fileio/EdlReading.h"
 #include "util/Result.h"

@@ -1,7 +1,9 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/serialize/ByteArchive.h"
 
-#include "tests/core/HexBytes.h"
 #include "tests/core/ThrownResult.h"
+#include "tests/core/model/HexBytes.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>

@@ -1,8 +1,10 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
 #include "core/serialize/Serializable.h"
 
 #include "core/serialize/ByteArchive.h"
-#include "tests/core/HexBytes.h"
 #include "tests/core/ThrownResult.h"
+#include "tests/core/model/HexBytes.h"
 
 #include <gtest/gtest.h>
 

@@ -1,0 +1,45 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/change/ChangeCandidate.h"
+#include "core/change/MaterialIndex.h"
+#include "core/time/Framerate.h"
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+namespace cadrel::core {
+
+class EventBase;
+
+/// Finds, for one new event after the other, the stretches of old programme that show the same material, and decides
+/// between those that claim the same source.
+///
+///     source        |------------ new event ------------|
+///     old events       |---- A ----|  |--- B ---|
+///     candidates       |---- A ----|  |--- B ---|           of overlapping ones, one survives
+class CandidateSearch {
+public:
+    explicit CandidateSearch(const Framerate& framerate) : m_framerate(framerate) {}
+
+    /// Adds a valid event of the old list, in the order of the list, under the name that it is compared by. Throws what
+    /// Timecode::toFrameCount throws for a timecode that isn't valid at the rate.
+    void addOldEvent(const std::string& name, const EventBase& event);
+    /// To be called when all are added, before the first search.
+    void finish() { m_index.finish(); }
+
+    /// The candidates that survive for a valid new event, in the order of the old events. `lastDisplacement` is that of
+    /// the previous placement, in seconds: of candidates of one length, that which keeps nearest to it survives. Throws
+    /// Result::OutOfRange when a candidate, also one that wouldn't survive, leaves the day.
+    std::vector<ChangeCandidate> survivingCandidates(const std::string& name, const EventBase& newEvent,
+                                                     double lastDisplacement) const;
+
+private:
+    Framerate m_framerate;
+    MaterialIndex m_index;
+    std::size_t m_oldEventCount = 0;
+};
+
+} // namespace cadrel::core

@@ -1,0 +1,175 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The edits of a change EDL that heal events and extend them.
+
+#include "core/change/HealProcessing.h"
+#include "core/edl/CutMap.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/edl/HealedEvent.h"
+#include "core/settings/Settings.h"
+#include "util/Result.h"
+
+#include <algorithm>
+#include <functional>
+#include <set>
+#include <utility>
+
+namespace cadrel::core {
+
+using util::Result;
+
+namespace {
+
+/// The events of `events` that stand in `selected`, in the list's order; a healed event is taken apart into its
+/// members.
+EventList withoutHealing(const EventList& events, const CutMap& selected)
+{
+    std::vector<std::shared_ptr<EventBase>> taken;
+    for (const auto& event : events.events()) {
+        if (!selected.contains(event))
+            continue;
+        if (const auto healed = std::dynamic_pointer_cast<HealedEvent>(event))
+            taken.insert(taken.end(), healed->healedEvents().events().begin(), healed->healedEvents().events().end());
+        else
+            taken.push_back(event);
+    }
+    EventList list;
+    list.append(std::move(taken));
+    return list;
+}
+
+/// Takes the events out whose timecodes are invalid, which healing would drop.
+EventList takeUntimed(EventList& events)
+{
+    EventList untimed;
+    for (const auto& event : events.events()) {
+        if (event->hasFlaw(EventFlaw::TimecodeInvalid))
+            untimed.add(event);
+    }
+    events.remove(untimed);
+    return untimed;
+}
+
+/// Whether two neighbours of the selection have other events between them in the whole.
+bool isFragmented(const CutMap& selected, const CutMap& whole)
+{
+    using Neighbours = std::pair<std::shared_ptr<EventBase>, std::shared_ptr<EventBase>>;
+    const auto neighboursOf = [](const CutMap& map) {
+        std::set<Neighbours> neighbours;
+        for (std::size_t index = 0; index + 1 < map.dstInOrder().size(); ++index)
+            neighbours.emplace(map.dstInOrder()[index].event.lock(), map.dstInOrder()[index + 1].event.lock());
+        return neighbours;
+    };
+    const std::set<Neighbours> inSelection = neighboursOf(selected);
+    const std::set<Neighbours> inWhole = neighboursOf(whole);
+    return !std::includes(inWhole.begin(), inWhole.end(), inSelection.begin(), inSelection.end());
+}
+
+HealContext makeContext(const EventList& referenceList, const Settings& settings)
+{
+    return {&referenceList, &settings, Timecode::framerate()};
+}
+
+/// The event before or behind `event` in the order of DST IN; null when there is none or the list doesn't hold it.
+std::shared_ptr<EventBase> neighbourOf(const EventList& events, const std::shared_ptr<EventBase>& event, bool previous)
+{
+    const CutMap map(events, Timecode::framerate());
+    if (!map.contains(event))
+        return nullptr;
+    const auto& order = map.dstInOrder();
+    const Timecode& key = event->dstIn();
+    if (previous) {
+        const auto place =
+            std::partition_point(order.begin(), order.end(), [&](const CutEntry& entry) { return entry.time < key; });
+        return place == order.begin() ? nullptr : std::prev(place)->event.lock();
+    }
+    const auto place =
+        std::partition_point(order.begin(), order.end(), [&](const CutEntry& entry) { return !(entry.time > key); });
+    return place == order.end() ? nullptr : place->event.lock();
+}
+
+} // namespace
+
+void EventList::heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode)
+{
+    stopListening();
+
+    const CutMap selected(selection, Timecode::framerate());
+    EventList healed = withoutHealing(*this, selected);
+    const EventList untimed = takeUntimed(healed);
+    Settings settings;
+    settings.setHealMode(healMode);
+    HealProcessing().process(healed, makeContext(referenceList, settings));
+
+    std::vector<std::shared_ptr<EventBase>> all;
+    std::remove_copy_if(m_events.begin(), m_events.end(), std::back_inserter(all),
+                        [&](const auto& event) { return selected.contains(event); });
+    all.insert(all.end(), healed.events().begin(), healed.events().end());
+    all.insert(all.end(), untimed.events().begin(), untimed.events().end());
+    std::sort(all.begin(), all.end(), [](const auto& a, const auto& b) { return a->dstIn() < b->dstIn(); });
+
+    std::vector<std::pair<HealedEvent*, std::string>> names;
+    for (const auto& event : all) {
+        if (auto* healedEvent = dynamic_cast<HealedEvent*>(event.get()))
+            names.emplace_back(healedEvent, HealProcessing::healedEventName(names.size() + 1));
+    }
+
+    // Nothing fails from here on.
+    m_events = std::move(all);
+    std::uint32_t number = 1;
+    for (const auto& event : m_events)
+        event->setEventNumber(number++);
+    for (const auto& [event, name] : names)
+        event->setRollName(name);
+    listen();
+    notifyListeners();
+}
+
+bool EventList::canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const
+{
+    const CutMap selected(selection, Timecode::framerate());
+    if (isFragmented(selected, CutMap(*this, Timecode::framerate())))
+        return false;
+    EventList collected = withoutHealing(*this, selected);
+    const EventList untimed = takeUntimed(collected);
+    Settings settings;
+    settings.setHealMode(healMode);
+    const std::size_t timed = HealProcessing().countAfter(collected, makeContext(referenceList, settings));
+    return timed + untimed.size() != selection.size();
+}
+
+void EventList::extendEvent(const std::shared_ptr<EventBase>& event, bool previous)
+{
+    stopListening();
+    if (const std::shared_ptr<EventBase> neighbour = neighbourOf(*this, event, previous)) {
+        if (previous) {
+            const Timecode dstIn = neighbour->dstOut();
+            const Timecode srcIn = event->srcIn() - (event->dstIn() - dstIn);
+            event->setDstIn(dstIn);
+            event->setSrcIn(srcIn);
+        } else {
+            const Timecode dstOut = neighbour->dstIn();
+            const Timecode srcOut = event->srcOut() + (dstOut - event->dstOut());
+            event->setDstOut(dstOut);
+            event->setSrcOut(srcOut);
+        }
+    }
+    listen();
+    notifyListeners();
+}
+
+bool EventList::canExtendEvent(const std::shared_ptr<EventBase>& event, bool previous) const
+{
+    try {
+        const std::shared_ptr<EventBase> neighbour = neighbourOf(*this, event, previous);
+        if (!neighbour)
+            return false;
+        const Timecode gap = previous ? event->dstIn() - neighbour->dstOut() : neighbour->dstIn() - event->dstOut();
+        return gap.toSeconds() > 0.0;
+    } catch (Result::Type) {
+        return false;
+    }
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,95 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/time/Framerate.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <span>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+namespace cadrel::core {
+
+class EventBase;
+
+/// A valid event's timecodes as frame counts, and what else decides whether two events show the same material in the
+/// same way.
+struct EventShape {
+    /// Throws what Timecode::toFrameCount throws.
+    EventShape(const EventBase& event, const Framerate& framerate);
+
+    /// Whether transition and motion speed (to 0.01) are the same.
+    bool isPlayedLike(const EventShape& other) const;
+
+    std::int32_t srcIn;
+    std::int32_t srcOut;
+    std::int32_t dstIn;
+    std::int32_t dstOut;
+    std::int32_t transitionType;
+    std::int32_t transitionDuration;
+    double motionSpeed;
+};
+
+/// The old events that use the very same stretch of source in the very same way, at different places of the programme.
+/// One new event meets all of them alike, so that whatever doesn't depend on the place is worked out once for all.
+struct TwinGroup {
+    struct Place {
+        std::int32_t dstIn;
+        std::size_t index; ///< of the event in the list of old events
+    };
+
+    EventShape shape;                     ///< of one of them
+    std::span<const Place> placesByTime;  ///< ascending by `dstIn`, then by index
+    std::span<const Place> placesByIndex; ///< the same, ascending by index
+    bool areOrdersEqual;                  ///< as they are where the old list is in the order of time
+};
+
+/// The old events by name and source range.
+class MaterialIndex {
+public:
+    MaterialIndex() = default;
+    MaterialIndex(const MaterialIndex&) = delete;
+    MaterialIndex& operator=(const MaterialIndex&) = delete;
+
+    /// Adds the event at `index` of the list of old events. An event without source overlaps nothing and is left out.
+    void add(const std::string& name, const EventShape& shape, std::size_t index);
+    /// To be called when all are added, before the first search.
+    void finish();
+
+    /// The groups under a name whose source range overlaps that from `srcIn` to `srcOut`.
+    std::vector<const TwinGroup*> groupsOverlapping(const std::string& name, std::int32_t srcIn,
+                                                    std::int32_t srcOut) const;
+
+private:
+    struct AddedEvent {
+        std::size_t material;
+        EventShape shape;
+        std::size_t index;
+    };
+
+    /// A range of `m_groups`: all material under one name, sorted by the start of its source.
+    struct Material {
+        std::size_t first = 0;
+        std::size_t behind = 0;
+    };
+
+    void makeGroups();
+    void addGroup(std::size_t first, std::size_t behind);
+    std::int32_t makeTree(Material range);
+    void collect(Material range, std::int32_t srcIn, std::int32_t srcOut, std::vector<const TwinGroup*>& found) const;
+
+    std::unordered_map<std::string, std::size_t> m_materialByName;
+    std::vector<AddedEvent> m_added;
+    std::vector<Material> m_materials;
+    std::vector<TwinGroup> m_groups;
+    std::vector<TwinGroup::Place> m_placesByTime;
+    std::vector<TwinGroup::Place> m_placesByIndex;
+    /// Each range of groups is a binary tree with its middle as the root; this is the latest source end of the subtree
+    /// under each group.
+    std::vector<std::int32_t> m_latestEnd;
+};
+
+} // namespace cadrel::core

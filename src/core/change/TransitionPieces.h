@@ -1,0 +1,27 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include <cstdint>
+
+namespace cadrel::core {
+
+class EventList;
+
+/// Cuts the dissolves and wipes out of their events: each becomes a cut, and a piece of its own behind all events of
+/// the list bears the transition.
+///
+///     one event       |<-- D 024 -->|------ body ------|
+///     two events      |---- piece --|                       dissolve, 24 frames
+///                                   |------ body ------|    cut
+///
+/// A piece whose event shares its number with the event before it, as the two lines of a transition do, is named after
+/// both. An event that isn't valid and whose transition can't be cut out stays whole. Throws what the timecode
+/// arithmetic throws for a valid one.
+void expandTransitions(EventList& events);
+
+/// Puts each transition piece and the body that follows it on both sides together again, and makes cuts of all events.
+/// Names are compared by clip name when `matchBy` is 1, otherwise by roll name.
+void mergeTransitionPieces(EventList& changeEvents, std::int32_t matchBy);
+
+} // namespace cadrel::core

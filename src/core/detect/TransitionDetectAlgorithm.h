@@ -1,0 +1,18 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/detect/CadrelInformationAlgorithm.h"
+
+namespace cadrel::core {
+
+/// Finds the dissolves and wipes of the new EDL that stand at no such place in the old one and lie inside no change
+/// event. A marker is as long as the transition, whose duration must lie within a day. Can't be cancelled.
+class TransitionDetectAlgorithm : public CadrelInformationAlgorithm {
+public:
+    std::vector<MarkerEntry> detect(const CutList& cuts, const CadrelRunState& state,
+                                    ProgressHandlerBase* progress) const override;
+    std::uint64_t estimateSteps(std::uint64_t eventCount, std::uint64_t trackCount) const override;
+};
+
+} // namespace cadrel::core

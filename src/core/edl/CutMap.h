@@ -1,0 +1,76 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/time/Framerate.h"
+#include "core/time/SecondsRange.h"
+#include "core/time/Timecode.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <vector>
+
+namespace cadrel::core {
+
+class EventBase;
+class EventList;
+
+/// An event at the time by which a CutMap sorts it.
+struct CutEntry {
+    Timecode time;
+    std::weak_ptr<EventBase> event;
+};
+
+/// A sorted, read-only view of one EventList for a moment: the events in time order, those that touch a stretch of
+/// time, and the parts of it that none covers, on either side. It follows no changes of the list. Events with
+/// EventFlaw::TimecodeInvalid are left out, since their seconds can't be computed; every other flaw leaves an event in.
+class CutMap {
+public:
+    /// Throws what Timecode::toSeconds throws under `framerate`.
+    CutMap(const EventList& events, const Framerate& framerate);
+
+    /// Sorted by DST IN; equal times in the list's order.
+    const std::vector<CutEntry>& dstInOrder() const { return m_byDstIn; }
+    /// Sorted by SRC IN; equal times in the list's order.
+    const std::vector<CutEntry>& srcInOrder() const { return m_bySrcIn; }
+    /// Whether this very event is in the map.
+    bool contains(const std::shared_ptr<EventBase>& event) const;
+
+    /// From the first to the last edge, in seconds; 0 to 0 for an empty map.
+    SecondsRange sourceSpan() const { return span(m_sourceEdges); }
+    SecondsRange destinationSpan() const { return span(m_destinationEdges); }
+
+    /// The events with an edge from `start` to `end` seconds, both included, in the order of the edges; an event whose
+    /// two edges have another event's between them stands twice. When there is no such edge, the event around the range.
+    /// Empty unless `start` is less than `end`.
+    std::vector<std::weak_ptr<EventBase>> eventsInSourceRange(double start, double end) const;
+    std::vector<std::weak_ptr<EventBase>> eventsInDestinationRange(double start, double end) const;
+
+    /// The parts of a range that no event covers, in ascending order, under the provider's rate. Throw
+    /// Result::InvalidArgument where an event ends before it starts, and what Timecode::toSeconds throws.
+    std::vector<SecondsRange> uncoveredSourceRanges(const SecondsRange& range) const;
+    std::vector<SecondsRange> uncoveredDestinationRanges(const SecondsRange& range) const;
+
+    /// Whether one of the events that eventsInDestinationRange answers covers the whole range, under the provider's
+    /// rate; throws what Timecode::toSeconds throws.
+    bool isDestinationRangeInsideAnEvent(const SecondsRange& range) const;
+
+private:
+    struct Edge {
+        double seconds;
+        std::uint32_t index; ///< of the event in `m_held`
+    };
+
+    static SecondsRange span(const std::vector<Edge>& edges);
+    std::vector<std::weak_ptr<EventBase>> eventsInRange(const std::vector<Edge>& edges, double start, double end) const;
+
+    std::vector<Edge> m_sourceEdges;
+    std::vector<Edge> m_destinationEdges;
+    std::vector<CutEntry> m_byDstIn;
+    std::vector<CutEntry> m_bySrcIn;
+    std::vector<std::shared_ptr<EventBase>> m_held; ///< in the list's order
+    std::vector<const EventBase*> m_heldByAddress;
+};
+
+} // namespace cadrel::core

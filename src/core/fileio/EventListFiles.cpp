@@ -1,0 +1,76 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/fileio/CmxParser.h"
+#include "core/fileio/CmxWriter.h"
+#include "util/Result.h"
+
+#include <algorithm>
+#include <string>
+#include <unordered_set>
+
+namespace cadrel::core {
+
+using util::Result;
+
+namespace {
+
+bool isNamedAsBRoll(const std::string& rollName)
+{
+    return rollName.ends_with('B');
+}
+
+/// Gives each B-roll the name of its roll, where the list has that roll.
+void renameBRollsOf(const EventList& list)
+{
+    const auto& events = list.events();
+    const bool hasBRolls =
+        std::any_of(events.begin(), events.end(), [](const auto& event) { return isNamedAsBRoll(event->rollName()); });
+    if (!hasBRolls)
+        return;
+
+    std::unordered_set<std::string> rollNames;
+    for (const auto& event : events)
+        rollNames.insert(event->rollName());
+    for (const auto& event : events) {
+        if (!isNamedAsBRoll(event->rollName()))
+            continue;
+        const std::string shorter = event->rollName().substr(0, event->rollName().size() - 1);
+        if (rollNames.contains(shorter))
+            event->setRollName(shorter);
+    }
+}
+
+} // namespace
+
+void EventList::load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
+                     bool acceptAudioChannels)
+{
+    if (!append)
+        clear();
+    EventList loaded;
+    fileio::CmxParser parser;
+    const Result::Type result = parser.parse(fileName, loaded, framerate, acceptAudioChannels);
+    if (result != Result::Ok)
+        throw result;
+    if (renameBRolls)
+        renameBRollsOf(loaded);
+    this->append(loaded.release());
+}
+
+void EventList::load(const std::wstring& fileName, bool append)
+{
+    Framerate unknown;
+    load(fileName, append, unknown, false, false);
+}
+
+void EventList::save(const std::wstring& fileName) const
+{
+    fileio::CmxWriter writer;
+    const Result::Type result = writer.write(fileName, *this);
+    if (result != Result::Ok)
+        throw result;
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,283 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/model/DataModel.h"
+
+#include "core/change/HealProcessing.h"
+#include "core/edl/CutMap.h"
+#include "core/edl/EventBase.h"
+#include "core/notify/ChangeContext.h"
+#include "core/serialize/ByteArchive.h"
+#include "core/settings/VfxNameMatcher.h"
+#include "core/time/SecondsRange.h"
+
+namespace cadrel::core {
+
+using serialize::ByteArchive;
+using util::Result;
+
+namespace {
+
+constexpr std::uint32_t PersistenceVersion = 1;
+
+} // namespace
+
+DataModel::DataModel()
+    : Serializable(PersistenceVersion), m_oldEdl(ListKind::Old), m_newEdl(ListKind::New), m_changeEdl(ListKind::Change)
+{
+    startListening();
+}
+
+DataModel::~DataModel()
+{
+    stopListening();
+}
+
+void DataModel::setNotifier(ChangeContextNotificationBase* notifier)
+{
+    m_notifier = notifier;
+}
+
+void DataModel::startListening()
+{
+    for (ChangeContextNotificationBase* source : sources())
+        source->addListener(this);
+}
+
+void DataModel::stopListening()
+{
+    for (ChangeContextNotificationBase* source : sources())
+        source->removeListener(this);
+}
+
+std::array<ChangeContextNotificationBase*, 5> DataModel::sources()
+{
+    return {&m_oldEdl, &m_newEdl, &m_changeEdl, &m_settings, &m_videoList};
+}
+
+void DataModel::send(const ChangeContext& context)
+{
+    if (m_notifier != nullptr)
+        m_notifier->notify(context);
+}
+
+void DataModel::onChange(const ChangeContext& context)
+{
+    send(context);
+}
+
+void DataModel::setProperty(std::int32_t key, const Variant& value)
+{
+    m_properties[key] = value;
+}
+
+bool DataModel::hasProperty(std::int32_t key) const
+{
+    return m_properties.contains(key);
+}
+
+void DataModel::removeProperty(std::int32_t key)
+{
+    m_properties.erase(key);
+}
+
+Result::Type DataModel::getProperty(std::int32_t key, Variant& value) const
+{
+    const auto found = m_properties.find(key);
+    if (found == m_properties.end())
+        return Result::InvalidArgument;
+    value = found->second;
+    return Result::Ok;
+}
+
+bool DataModel::isPreviewActive() const
+{
+    Variant flag(false);
+    getProperty(PropertyKey::PreviewActive, flag);
+    return flag.toBool();
+}
+
+void DataModel::setPreviewActive(bool flag)
+{
+    setProperty(PropertyKey::PreviewActive, Variant(flag));
+}
+
+void DataModel::notifyPreviewState()
+{
+    m_notifier->notify(ChangeContext(ChangeContext::PreviewStateChanged));
+}
+
+Result::Type DataModel::generateChangeEdl()
+{
+    stopListening();
+    const Result::Type result = generateAndHeal();
+    if (result != Result::Ok)
+        m_changeEdl.clear();
+    startListening();
+    send(EventListChangeContext(m_changeEdl.listKind()));
+    return result;
+}
+
+Result::Type DataModel::generateAndHeal()
+{
+    try {
+        m_generator.configure(m_settings.matchBy(), m_settings.vfxPatterns());
+        const Result::Type result = m_generator.generate(m_oldEdl, m_newEdl, m_changeEdl);
+        if (result == Result::Ok)
+            HealProcessing().process(m_changeEdl, {&m_newEdl, &m_settings, Timecode::framerate()});
+        return result;
+    } catch (Result::Type failure) {
+        return failure;
+    }
+}
+
+void DataModel::applyVfxHandling()
+{
+    VfxNameMatcher patterns;
+    patterns.compileEnabled(m_settings.vfxPatterns());
+    m_oldEdl.markVfx(patterns, m_settings.matchBy());
+    m_newEdl.markVfx(patterns, m_settings.matchBy());
+}
+
+EventList DataModel::oldEventsFor(const std::shared_ptr<EventBase>& changeEvent) const
+{
+    if (!isPlacedChange(changeEvent))
+        return EventList();
+    return eventsOf(m_oldEdl, changeEvent->srcIn(), changeEvent->srcOut());
+}
+
+EventList DataModel::newEventsFor(const std::shared_ptr<EventBase>& changeEvent) const
+{
+    if (!isPlacedChange(changeEvent))
+        return EventList();
+    return eventsOf(m_newEdl, changeEvent->dstIn(), changeEvent->dstOut());
+}
+
+bool DataModel::isPlacedChange(const std::shared_ptr<EventBase>& event) const
+{
+    return m_changeEdl.contains(event) && !event->hasFlaw(EventFlaw::TimecodeInvalid) &&
+           event->srcIn() < event->srcOut() && event->dstIn() < event->dstOut();
+}
+
+EventList DataModel::eventsOf(const EventList& programme, const Timecode& in, const Timecode& out)
+{
+    const CutMap map(programme, Timecode::framerate());
+    // Shrunk, so that a neighbour that merely touches isn't hit.
+    const double start = in.toSeconds() + SameInstant;
+    const double end = out.toSeconds() - SameInstant;
+    if (start > end)
+        throw Result::InvalidArgument;
+    EventList found;
+    for (const auto& event : map.eventsInDestinationRange(start, end))
+        found.add(std::shared_ptr<EventBase>(event));
+    return found;
+}
+
+void DataModel::revalidateEvents()
+{
+    stopListening();
+    try {
+        for (const EventList* list : {&m_oldEdl, &m_newEdl, &m_changeEdl}) {
+            for (const auto& event : list->events())
+                event->revalidate();
+        }
+    } catch (...) {
+        startListening();
+        throw;
+    }
+    startListening();
+    send(DataModelChangeContext(this));
+}
+
+void DataModel::reset()
+{
+    m_oldEdl.clear();
+    m_newEdl.clear();
+    m_changeEdl.clear();
+    m_properties.clear();
+    m_settings.reset();
+    m_videoList.clear();
+}
+
+void DataModel::restore(ByteArchive& archive)
+{
+    const Settings kept = m_settings;
+    const auto finish = [&] {
+        m_restoring = false;
+        m_settings = kept;
+        send(DataModelChangeContext(this));
+    };
+    m_restoring = true;
+    try {
+        deserialize(archive);
+    } catch (...) {
+        finish();
+        throw;
+    }
+    finish();
+}
+
+void DataModel::readCurrent(ByteArchive& archive)
+{
+    stopListening();
+    Result::Type result = Result::Ok;
+    try {
+        readMembers(archive);
+        archive >> m_videoList;
+    } catch (Result::Type failure) {
+        result = failure;
+    } catch (...) {
+        result = Result::NotAvailable;
+    }
+    finishReading(result, !m_restoring);
+}
+
+void DataModel::readOlder(ByteArchive& archive, std::uint32_t version)
+{
+    stopListening();
+    Result::Type result = Result::Ok;
+    try {
+        if (version != 0)
+            throw Result::UnknownVersion;
+        readMembers(archive);
+    } catch (Result::Type) {
+        result = Result::UnknownVersion;
+    } catch (...) {
+        result = Result::NotAvailable;
+    }
+    finishReading(result, result == Result::Ok || !m_restoring);
+}
+
+void DataModel::finishReading(Result::Type result, bool notifies)
+{
+    if (result != Result::Ok)
+        reset();
+    startListening();
+    if (notifies)
+        send(DataModelChangeContext(this));
+    if (result != Result::Ok)
+        throw result;
+}
+
+void DataModel::readMembers(ByteArchive& archive)
+{
+    archive >> m_oldEdl >> m_newEdl >> m_changeEdl;
+    m_properties.clear();
+    const std::size_t count = archive.readCount();
+    for (std::size_t index = 0; index < count; ++index) {
+        std::int32_t key = 0;
+        archive >> key;
+        archive >> m_properties[key];
+    }
+    archive >> m_settings;
+}
+
+void DataModel::write(ByteArchive& archive) const
+{
+    archive << m_oldEdl << m_newEdl << m_changeEdl;
+    archive.writeCount(m_properties.size());
+    for (const auto& [key, value] : m_properties)
+        archive << key << value;
+    archive << m_settings << m_videoList;
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,97 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/time/SecondsRange.h"
+#include "host/track/HostEvent.h"
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace Velmark {
+class IEditTransaction;
+} // namespace Velmark
+
+namespace cadrel::core {
+class EventBase;
+} // namespace cadrel::core
+
+namespace cadrel::host {
+
+class Project;
+class Track;
+
+/// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
+/// copy have the same user id. What the user doesn't touch stays as it is, also where two events show the same memo. A copy
+/// that is taken over an edge of its stretch is followed to the edge; one that is taken out of all stretches leaves its memo
+/// as it was.
+class MemoSync {
+public:
+    explicit MemoSync(Project& project) : m_project(project) {}
+
+    /// Carries over what has become of the copies since they were remembered or, where they weren't, whatever differs. Needs
+    /// the preview offset. Throws Result::HostObjectMissing and Result::HostCallFailed.
+    void follow(const Track& memos, Velmark::IEditTransaction& transaction);
+    /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.
+    void remember(const Track& memos);
+    void forget() { m_remembered.clear(); }
+
+private:
+    /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's
+    /// clock.
+    struct Stretch {
+        core::SecondsRange source;
+        core::SecondsRange preview;
+
+        double clamped(double sourceTime) const;
+        double toSource(double previewTime) const;
+    };
+    struct Memo {
+        std::int64_t id;
+        std::wstring name;
+        double start;
+        double end;
+
+        bool operator==(const Memo&) const = default;
+    };
+    using Memos = std::vector<Memo>;
+    using Events = std::vector<std::shared_ptr<core::EventBase>>;
+    /// A stretch with the copies that belong to it.
+    struct Shown {
+        std::shared_ptr<core::EventBase> event;
+        Stretch stretch;
+        std::vector<HostEvent> copies;
+    };
+    /// Each memo behind the preview offset belongs to the first stretch in which most of it lies or, where there is none, to
+    /// the first into which it reaches.
+    struct Preview {
+        std::vector<Shown> shown;      ///< in the order of the events
+        std::vector<HostEvent> adrift; ///< in no stretch
+    };
+
+    static std::vector<Stretch> stretchesOf(const Project& project, const Events& events, std::size_t index);
+    Preview previewOf(const Track& memos) const;
+    std::vector<HostEvent> memosIn(const Track& memos, const core::SecondsRange& range) const;
+    static Memo memoOf(const HostEvent& event);
+    /// Null when there is none.
+    static const Memo* findById(const Memos& memos, std::int64_t id);
+    /// The memos of those adrift stay.
+    void followStretch(const Track& memos, Velmark::IEditTransaction& transaction, const Shown& shown,
+                       const std::vector<HostEvent>& adrift, const Memos* remembered);
+    /// The memos that a stretch shows.
+    std::vector<HostEvent> sourcesOf(const Track& memos, const Stretch& stretch,
+                                     const std::vector<HostEvent>& copies) const;
+    /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
+    static void keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered);
+    /// What the copy was like is null where that isn't known.
+    static void carryOver(Velmark::IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo,
+                          const Stretch& stretch, const Memo* remembered);
+
+    Project& m_project;
+    std::map<std::shared_ptr<core::EventBase>, Memos> m_remembered;
+};
+
+} // namespace cadrel::host

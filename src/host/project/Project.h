@@ -1,0 +1,240 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/cut/CadrelPreviewState.h"
+#include "core/cut/CadrelRunState.h"
+#include "core/cut/MarkerEntry.h"
+#include "core/edl/EventList.h"
+#include "core/model/DataModel.h"
+#include "core/time/FramerateProvider.h"
+#include "host/project/MediaPool.h"
+#include "host/project/MemoSync.h"
+#include "host/track/ProjectListener.h"
+#include "host/track/Track.h"
+#include "host/track/TrackIndexes.h"
+#include "host/track/TrackRole.h"
+#include "util/ListenerSet.h"
+#include "velmark/Counted.h"
+#include "velmark/Editing.h"
+#include "velmark/Project.h"
+#include "velmark/ProjectNode.h"
+#include "velmark/Tracks.h"
+
+#include <array>
+#include <cstdint>
+#include <limits>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace Velmark {
+class IHostContext;
+class IParameter;
+} // namespace Velmark
+
+namespace cadrel::core {
+class Cut;
+class CutList;
+class EventBase;
+class ProgressHandlerBase;
+} // namespace cadrel::core
+
+namespace cadrel::host {
+
+class FirstFailure;
+class VideoProvider;
+
+/// One project of the host: it owns the model that belongs to it, finds and makes the tracks on which the system writes, and
+/// does to the host's tracks what the engine decides.
+///
+/// Times are those of the project's clock, in seconds; what goes to the host loses the time origin on the way. A run writes
+/// first in the preview stretch, a whole number of days later, which no material reaches:
+///
+///     time origin                          preview offset
+///     |-- real programme --|                    |-- preview stretch --|
+///           source  |=====|  ------------------------>  |=====|  destination + offset
+///
+/// Failures are thrown as Result::Type: HostObjectMissing, HostCallFailed, and NotAvailable where an operation needs the
+/// preview offset or a live track and has none.
+class Project final : public core::FramerateProvider {
+public:
+    /// The preview offset of a project that has none.
+    static constexpr double NoPreviewOffset = std::numeric_limits<double>::lowest();
+
+    /// None of them is owned. The document outlives the project; the provider may be null.
+    Project(Velmark::IHostContext* context, Velmark::IProjectDocument* document, VideoProvider* videoProvider);
+    Project(const Project&) = delete;
+    Project& operator=(const Project&) = delete;
+    ~Project();
+
+    Velmark::IProjectDocument* document() const { return m_document; }
+    Velmark::IHostContext* hostContext() const { return m_hostContext; }
+    core::DataModel& model() { return m_model; }
+    MediaPool& mediaPool() { return m_mediaPool; }
+
+    // Storage, as attributes of the host's project; in ProjectStorage.cpp.
+
+    /// Finds the tracks that are held locked and reads the stored model, if there is one, into the fresh project. When no
+    /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
+    /// model is empty then.
+    void load();
+    /// Replaces what is stored. A failure leaves nothing stored.
+    void save();
+
+    /// The host's rate, as it was when it told of changes last. Throws Result::NotSupported for a rate that isn't one.
+    core::Framerate getFramerate() const override;
+
+    // Tracks.
+
+    /// All tracks of the host, depth first: a folder comes before what it holds. Throws Result::HostObjectMissing for a
+    /// track that cannot be handled as one.
+    std::vector<Velmark::Counted<Velmark::ITrackNode>> allTracks();
+    std::vector<Track> tracksOfType(const char* word);
+    /// All but folders and rulers: those that a run may change.
+    std::vector<Track> cadrelTracks();
+    /// Those of them that the user hasn't locked: what the system itself holds locked, a run frees.
+    std::vector<Track> availableTracks();
+    /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
+    /// alone, in which nobody else edits.
+    void setUseTrackCache(bool flag);
+    bool isTrackAlive(const Velmark::ITrackNode* track);
+    /// The context of an object's times; null gives the root's.
+    Velmark::Counted<Velmark::FUnknown> containerOf(Velmark::FUnknown* object);
+
+    // Times.
+
+    double timeOrigin() const;
+    double projectEnd() const;
+    bool hasPreviewOffset() const;
+    /// NoPreviewOffset when there is none.
+    double previewOffset() const;
+    void resetPreviewOffset();
+    /// Stores the first whole day past every event in the project as the offset; automation points further on don't
+    /// count.
+    void computePreviewOffset();
+    void getLocators(double& left, double& right) const;
+    /// With `adjust` both move down by a tenth of their distance and lose the time origin; without they go to the host as
+    /// they are.
+    void setLocators(bool adjust, double left, double right);
+
+    // The tracks of the system; in ProjectTracks.cpp.
+
+    /// Finds or makes the folder and the tracks of the markers that are switched on, and gives every memo a user id
+    /// of its own.
+    void createMarkerTracks(Velmark::IEditTransaction& transaction);
+    /// Finds or makes the track of the new picture; does nothing without new videos.
+    void createVideoTracks(Velmark::IEditTransaction& transaction);
+    /// Locks or unlocks what collectLockTracks has found, the track of the new picture and the marker tracks but the
+    /// memos'. Carries out all, and throws the first failure at the end.
+    void setTracksLocked(bool lock);
+    /// The tracks that a run would change and that the user hasn't locked.
+    void collectLockTracks();
+    /// Adds the tracks that the system holds locked, as a file or an undo has left them.
+    void findLockedTracks();
+    bool hasLockTracks() const { return !m_lockedTracks.empty(); }
+    void releaseLockTracks() { m_lockedTracks.clear(); }
+
+    // Work for the engine; in ProjectEdits.cpp.
+
+    /// Writes the source of the cut's events to their destination in the preview stretch.
+    void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
+    /// The tracks are those that take part in a run, and the memos'.
+    std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
+    /// Brings the preview stretch back over the real programme. A restricted run clears the preview too, also where its
+    /// range is empty and nothing is brought back.
+    void completeApply(Velmark::IEditTransaction& transaction);
+    /// Writes each on the track of its kind, and none whose track isn't there. Throws Result::InvalidArgument for an entry
+    /// whose kind is none of MarkerKind; earlier ones stay written.
+    void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
+    /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what
+    /// another cut has written there. The cuts are those that makeCut made.
+    void markVirginTerritories(Velmark::IEditTransaction& transaction, const core::CutList& cuts);
+    /// Unlocks the tracks and empties the preview stretch.
+    void clearPreview(Velmark::IEditTransaction& transaction);
+    /// What a run replaces.
+    void getApplyRange(double& start, double& end) const;
+    /// Lets the host join the pieces that the cuts have left of one clip.
+    void closeRange(bool onlySelected, double start, double end);
+    /// Makes room for the preview; does nothing unless preview is on. With `active` only tracks that have changed count.
+    void extendProjectEnd(bool active);
+    core::CadrelRunState runState();
+    core::CadrelPreviewState previewState();
+    core::EventList& previewEvents() { return m_previewEvents; }
+    /// Not owned; null outside of a run.
+    void setProgress(core::ProgressHandlerBase* progress) { m_progress = progress; }
+
+    // What the host tells.
+
+    /// Carries out all, and throws the first failure at the end: reads the rate anew, and tells all listeners.
+    void onProjectChanged();
+    /// The same: lets the memos follow their copies in the preview, and tells all listeners.
+    void onProjectEdited(Velmark::IEditTransaction& transaction);
+    /// Not owned.
+    void addListener(ProjectListener* listener) { m_listeners.add(listener); }
+    void removeListener(ProjectListener* listener) { m_listeners.remove(listener); }
+
+private:
+    void readModel();
+    core::Framerate readFramerate() const;
+    void updateFramerate();
+    /// The seconds of a day of the clock under the project's rate.
+    double dayLength() const;
+    /// The start of the first whole day past a time.
+    double dayAfter(double seconds) const;
+    /// Throws Result::NotAvailable without one.
+    double requiredOffset() const;
+    /// The latest end of an event of these tracks that starts before a time, `earliest` at the least.
+    double latestEnd(const std::vector<Track>& tracks, double before, double earliest) const;
+    Velmark::Counted<Velmark::IProjectNode> root() const;
+    Velmark::IParameter& locator(const char* name) const;
+    void tellListeners(FirstFailure& failure);
+    bool isPreviewing() const;
+    void syncMemos(Velmark::IEditTransaction& transaction);
+    void rememberMemos();
+
+    // Tracks of the system.
+    Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
+    bool isMarkerTrack(const Track& track) const;
+    Track newVideoTrack();
+    /// Puts a track of that role into the slot unless the one there is alive. False when there is none.
+    bool findTrack(Track& slot, const char* word, std::int32_t role);
+    void findOrCreateTrack(Velmark::IEditTransaction& transaction, Track& slot, const char* word, std::int32_t role);
+    void findOrCreateMarkerTrack(Velmark::IEditTransaction& transaction, std::int32_t role);
+    Track createTrack(const char* word);
+    /// Inserts a new track and makes it known by its role.
+    void insertTrack(Velmark::IEditTransaction& transaction, Velmark::FUnknown* parent, Track& track,
+                     std::int32_t role);
+    bool isMarkerRoleOn(std::int32_t role) const;
+
+    // Edits.
+    /// Selected, where the settings ask for selected tracks alone.
+    bool isWanted(const Track& track) const;
+    Velmark::Counted<Velmark::IObjectList> listOf(const std::vector<const Track*>& tracks) const;
+    void copyRange(const std::vector<const Track*>& tracks, double start, double end, double destination);
+    void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);
+    void moveBack(Velmark::IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end);
+    void writeDestinationMarker(Velmark::IEditTransaction& transaction, const core::EventBase& event);
+    void tick(std::uint64_t steps);
+
+    util::ListenerSet<ProjectListener> m_listeners; ///< before all tracks, which are among them
+    Velmark::IProjectDocument* m_document;
+    MediaPool m_mediaPool;
+    VideoProvider* m_videoProvider;
+    std::array<Track, TrackRole::LastMarker> m_markerTracks; ///< by role, less one
+    Track m_folderTrack;
+    /// Nothing while it isn't in use, and until it's filled.
+    std::optional<std::vector<Velmark::Counted<Velmark::ITrackNode>>> m_trackCache;
+    core::DataModel m_model;
+    Velmark::IHostContext* m_hostContext;
+    mutable core::Framerate m_framerate; ///< unknown until it's read
+    core::EventList m_previewEvents{core::ListKind::Change};
+    std::vector<Track> m_lockedTracks;
+    core::ProgressHandlerBase* m_progress = nullptr;
+    bool m_useTrackCache = false;
+    TrackIndexes m_indexes; ///< cleared by each edit
+    MemoSync m_memoSync{*this};
+};
+
+} // namespace cadrel::host

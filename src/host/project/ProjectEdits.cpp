@@ -1,0 +1,375 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/cut/Cut.h"
+#include "core/cut/CutList.h"
+#include "core/cut/ProgressHandlerBase.h"
+#include "core/edl/EventBase.h"
+#include "core/settings/MatchBy.h"
+#include "core/settings/Settings.h"
+#include "core/time/SecondsRange.h"
+#include "host/border/HostFailure.h"
+#include "host/project/Project.h"
+#include "host/track/AutomationCurve.h"
+#include "host/track/CutEvent.h"
+#include "host/track/Instant.h"
+#include "host/track/Marker.h"
+#include "util/Result.h"
+#include "util/StringUtil.h"
+#include "velmark/ClassId.h"
+#include "velmark/Context.h"
+
+#include <algorithm>
+#include <map>
+#include <string>
+#include <utility>
+
+using namespace Velmark;
+using cadrel::core::ApplyTo;
+using cadrel::core::MarkerKind;
+using cadrel::core::SecondsRange;
+using cadrel::util::Result;
+using cadrel::util::StringUtil;
+
+namespace cadrel::host {
+
+namespace {
+
+/// The cut events of a cut that have the same source range.
+struct SourceGroup {
+    SecondsRange source;
+    double destination;
+    std::vector<const Track*> tracks;
+};
+
+bool precedes(const SecondsRange& a, const SecondsRange& b)
+{
+    return isBefore(a.start, b.start) || (!isBefore(b.start, a.start) && isBefore(a.end, b.end));
+}
+
+/// Cuts that stand no further apart meet, in seconds.
+constexpr double ShortestGap = 0.01;
+
+bool isLongEnough(const SecondsRange& gap)
+{
+    return isBefore(ShortestGap, gap.end - gap.start);
+}
+
+const CutEvent& hostEvent(const std::shared_ptr<core::CutEventBase>& cutEvent)
+{
+    return dynamic_cast<const CutEvent&>(*cutEvent);
+}
+
+/// In ascending order.
+std::vector<SourceGroup> groupsOf(const core::Cut& cut)
+{
+    std::vector<SourceGroup> groups;
+    for (const auto& cutEvent : cut.cutEvents()) {
+        const SecondsRange source{cutEvent->srcIn(), cutEvent->srcOut()};
+        auto place = std::ranges::find_if(
+            groups, [&source](const SourceGroup& group) { return !precedes(group.source, source); });
+        if (place == groups.end() || precedes(source, place->source))
+            place = groups.insert(place, {source, cutEvent->dstIn(), {}});
+        place->tracks.push_back(&hostEvent(cutEvent).track());
+    }
+    return groups;
+}
+
+/// The automation of a track in which the cuts have left gaps.
+struct GapTrack {
+    std::vector<AutomationCurve> curves;
+    /// What the cuts have written, and the gaps that are filled. In seconds, without the offset.
+    std::vector<SecondsRange> done;
+};
+
+/// Adds a stretch to ranges that ascend and stand apart, and answers the pieces of it that none of them covered.
+std::vector<SecondsRange> cover(std::vector<SecondsRange>& ranges, const SecondsRange& stretch)
+{
+    const auto first = std::ranges::partition_point(
+        ranges, [&stretch](const SecondsRange& range) { return isBefore(range.end, stretch.start); });
+    SecondsRange whole = stretch;
+    if (first != ranges.end())
+        whole.start = std::min(whole.start, first->start);
+    std::vector<SecondsRange> pieces;
+    double covered = stretch.start;
+    auto behind = first;
+    for (; behind != ranges.end() && !isBefore(stretch.end, behind->start); ++behind) {
+        if (isBefore(covered, behind->start))
+            pieces.push_back({covered, behind->start});
+        covered = std::max(covered, behind->end);
+    }
+    if (isBefore(covered, stretch.end))
+        pieces.push_back({covered, stretch.end});
+    whole.end = std::max(whole.end, covered);
+    ranges.insert(ranges.erase(first, behind), whole);
+    return pieces;
+}
+
+std::vector<const Track*> pointersTo(const std::vector<Track>& tracks)
+{
+    std::vector<const Track*> pointers;
+    for (const Track& track : tracks)
+        pointers.push_back(&track);
+    return pointers;
+}
+
+/// The text of an EDL as the host can take it: one that is no UTF-8 has "?" for all that isn't ASCII.
+std::string hostText(std::string text)
+{
+    try {
+        StringUtil::toWide(text);
+    } catch (Result::Type failure) {
+        if (failure != Result::InvalidArgument)
+            throw;
+        std::ranges::replace_if(
+            text, [](char byte) { return (static_cast<unsigned char>(byte) & 0x80) != 0; }, '?');
+    }
+    return text;
+}
+
+std::int32_t roleOf(std::int32_t markerKind)
+{
+    switch (markerKind) {
+    case MarkerKind::Insert:
+        return TrackRole::Insert;
+    case MarkerKind::DissolveWipe:
+        return TrackRole::DissolveWipe;
+    case MarkerKind::AutomationWarning:
+        return TrackRole::AutomationWarning;
+    case MarkerKind::AudioSnippet:
+        return TrackRole::AudioSnippet;
+    case MarkerKind::Overlap:
+        return TrackRole::Overlap;
+    default:
+        throw Result::InvalidArgument;
+    }
+}
+
+/// The blank behind a reel is deliberate.
+std::wstring destinationName(const core::EventBase& event, const core::Settings& settings)
+{
+    const std::string name = settings.matchBy() == core::MatchBy::ClipName ? event.clipName() : event.rollName() + " ";
+    return L"Event: " + std::to_wstring(event.eventNumber()) + L" - " + StringUtil::toWide(hostText(name));
+}
+
+} // namespace
+
+std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBase>& changeEvent)
+{
+    const core::Framerate framerate = getFramerate();
+    const double srcIn = changeEvent->srcIn().toSeconds(framerate);
+    const double srcOut = changeEvent->srcOut().toSeconds(framerate);
+    const double dstIn = changeEvent->dstIn().toSeconds(framerate);
+    const double dstOut = changeEvent->dstOut().toSeconds(framerate);
+
+    core::Cut::CutEvents cutEvents;
+    for (const Track& track : cadrelTracks()) {
+        // completeApply empties the memos' track, whatever is selected.
+        if (track.hostLocked() || !(isWanted(track) || track == markerTrack(TrackRole::Memos)))
+            continue;
+        auto cutEvent = std::make_shared<CutEvent>(track, m_indexes);
+        cutEvent->setSrcIn(srcIn);
+        cutEvent->setSrcOut(srcOut);
+        cutEvent->setDstIn(dstIn);
+        cutEvent->setDstOut(dstOut);
+        cutEvents.push_back(std::move(cutEvent));
+    }
+    return std::make_shared<core::Cut>(changeEvent, std::move(cutEvents));
+}
+
+void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
+{
+    const double offset = requiredOffset();
+    const core::EventBase& event = *cut.event();
+    if (m_progress)
+        m_progress->setText(destinationName(event, m_model.settings()));
+    for (const SourceGroup& group : groupsOf(cut)) {
+        if (isBefore(group.source.start, group.source.end))
+            copyRange(group.tracks, group.source.start, group.source.end, group.destination + offset);
+    }
+    tick(cut.cutEvents().size());
+    if (m_model.settings().createDestinationMarkers())
+        writeDestinationMarker(transaction, event);
+}
+
+void Project::writeDestinationMarker(IEditTransaction& transaction, const core::EventBase& event)
+{
+    const double offset = requiredOffset();
+    const core::Framerate framerate = getFramerate();
+    m_indexes.clear();
+    Marker{event.dstIn().toSeconds(framerate) + offset, event.dstOut().toSeconds(framerate) + offset,
+           destinationName(event, m_model.settings()), hostText(event.rollName())}
+        .insertInto(m_hostContext, transaction, markerTrack(TrackRole::Destination));
+}
+
+void Project::generateMarkers(IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries)
+{
+    const double offset = requiredOffset();
+    m_indexes.clear();
+    for (const core::MarkerEntry& entry : entries) {
+        const Track& track = markerTrack(roleOf(entry.kind));
+        if (!track.isAlive())
+            continue;
+        Marker{entry.start + offset, entry.end + offset, StringUtil::toWide(hostText(entry.name)), {}}.insertInto(
+            m_hostContext, transaction, track);
+        tick(1);
+    }
+}
+
+//     cuts       |---- i - 1 ----|        |---- i ----|
+//     curve    --+--.      .-----+--------+---.   .---+--
+//                    `----'                    `-'
+//
+// Cuts are in the order of the change list, so that another one may lie between them.
+void Project::markVirginTerritories(IEditTransaction& transaction, const core::CutList& cuts)
+{
+    const double offset = requiredOffset();
+    m_indexes.clear();
+    std::map<const ITrackNode*, GapTrack> tracks;
+    for (const Track& track : cadrelTracks()) {
+        if (isWanted(track) && !track.hostLocked())
+            tracks.emplace(track.node(), GapTrack{track.prepareVirginRange(), {}});
+    }
+    for (std::size_t i = 0; i < cuts.size(); ++i) {
+        for (const auto& cutEvent : cuts.cutAt(i)->cutEvents()) {
+            const auto ofTrack = tracks.find(hostEvent(cutEvent).track().node());
+            if (ofTrack != tracks.end() && isBefore(cutEvent->dstIn(), cutEvent->dstOut()))
+                cover(ofTrack->second.done, {cutEvent->dstIn(), cutEvent->dstOut()});
+        }
+    }
+    for (std::size_t i = 1; i < cuts.size(); ++i) {
+        tick(tracks.size());
+        const core::Cut& before = *cuts.cutAt(i - 1);
+        const core::Cut& behind = *cuts.cutAt(i);
+        if (behind.event()->dstIn() == before.event()->dstOut())
+            continue;
+        // The cuts of a run have their tracks in the same order.
+        const std::size_t count = std::min(before.cutEvents().size(), behind.cutEvents().size());
+        for (std::size_t index = 0; index < count; ++index) {
+            const CutEvent& a = hostEvent(before.cutEvents()[index]);
+            const CutEvent& b = hostEvent(behind.cutEvents()[index]);
+            const auto ofTrack = tracks.find(a.track().node());
+            const SecondsRange gap{a.dstOut(), b.dstIn()};
+            if (!(b.track() == a.track()) || ofTrack == tracks.end() || !isLongEnough(gap))
+                continue;
+            auto& [curves, done] = ofTrack->second;
+            for (const SecondsRange& piece : cover(done, gap)) {
+                if (isLongEnough(piece))
+                    a.track().fillAutomationGap(transaction, curves, piece.start + offset, piece.end + offset);
+            }
+        }
+    }
+}
+
+void Project::completeApply(IEditTransaction& transaction)
+{
+    std::vector<Track> tracks = cadrelTracks();
+    std::erase_if(tracks, [this](const Track& track) {
+        return track.hostLocked() || !(isWanted(track) || isMarkerTrack(track));
+    });
+    double start = 0.0;
+    double end = 0.0;
+    getApplyRange(start, end);
+    if (isBefore(start, end))
+        moveBack(transaction, tracks, start, end);
+    if (m_model.settings().restrictRange())
+        clearPreview(transaction);
+}
+
+//     before    real |== old ==|           preview |== new ==|
+//     behind    real |== new ==|           preview
+void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end)
+{
+    const double offset = requiredOffset();
+    m_indexes.clear();
+    for (Track& track : tracks) {
+        track.removeRange(transaction, start, end);
+        tick(1);
+    }
+    // What stands before the stretch is the real programme's own, and an edge there would leave points behind.
+    const double written = std::max(start, 0.0);
+    if (!isBefore(written, end))
+        return;
+    copyRange(pointersTo(tracks), written + offset, end + offset, written);
+    deleteRange(transaction, written + offset, end + offset);
+}
+
+void Project::clearPreview(IEditTransaction& transaction)
+{
+    const double offset = requiredOffset();
+    setTracksLocked(false);
+    // Automation may reach further than the events, which alone make the end of the project.
+    deleteRange(transaction, offset, offset + std::max(offset, projectEnd()));
+}
+
+void Project::getApplyRange(double& start, double& end) const
+{
+    const double offset = requiredOffset();
+    const core::Settings& settings = m_model.settings();
+    start = settings.restrictRange() ? settings.preserveMaterialBefore() : 0.0;
+    end = settings.restrictRange() ? settings.preserveMaterialAfter() : offset;
+}
+
+void Project::closeRange(bool onlySelected, double start, double end)
+{
+    m_indexes.clear();
+    std::vector<Track> tracks = cadrelTracks();
+    std::erase_if(tracks, [onlySelected](const Track& track) {
+        return track.hostLocked() || (onlySelected && !track.isSelected());
+    });
+    const double origin = timeOrigin();
+    const int32 result =
+        required(service<IEditService>(m_hostContext))
+            ->closeRange(m_document, listOf(pointersTo(tracks)).get(), start - origin, end - origin, 0.0);
+    // Nothing to join is no failure.
+    if (result != ResultFalse)
+        requireOk(result);
+}
+
+void Project::extendProjectEnd(bool active)
+{
+    if (!m_model.isPreviewActive())
+        return;
+    const double offset = requiredOffset();
+    std::vector<Track> tracks = cadrelTracks();
+    if (active)
+        std::erase_if(tracks, [](const Track& track) { return !track.hasChanged(); });
+    const double end = offset + dayAfter(latestEnd(tracks, offset, 0.0));
+    if (end > projectEnd())
+        requireOk(m_document->setProjectEnd(end - timeOrigin()));
+}
+
+bool Project::isWanted(const Track& track) const
+{
+    return m_model.settings().applyTo() != ApplyTo::SelectedTracks || track.isSelected();
+}
+
+Counted<IObjectList> Project::listOf(const std::vector<const Track*>& tracks) const
+{
+    auto list = required(create<IObjectList>(m_hostContext));
+    for (const Track* track : tracks)
+        requireOk(list->add(track->node(), 0));
+    return list;
+}
+
+void Project::copyRange(const std::vector<const Track*>& tracks, double start, double end, double destination)
+{
+    m_indexes.clear();
+    const double origin = timeOrigin();
+    requireOk(required(service<IEditService>(m_hostContext))
+                  ->copyRange(m_document, listOf(tracks).get(), 0, start - origin, end - origin, destination - origin));
+}
+
+void Project::deleteRange(IEditTransaction& transaction, double start, double end)
+{
+    m_indexes.clear();
+    const double origin = timeOrigin();
+    requireOk(transaction.deleteRange(m_document, 0, start - origin, end - origin));
+}
+
+void Project::tick(std::uint64_t steps)
+{
+    if (m_progress)
+        m_progress->tick(steps);
+}
+
+} // namespace cadrel::host

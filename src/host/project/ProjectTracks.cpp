@@ -1,0 +1,178 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/settings/Settings.h"
+#include "host/border/FirstFailure.h"
+#include "host/border/HostFailure.h"
+#include "host/picture/VideoProvider.h"
+#include "host/project/Project.h"
+#include "velmark/Editing.h"
+
+#include <algorithm>
+#include <array>
+
+using namespace Velmark;
+
+namespace cadrel::host {
+
+namespace {
+
+/// Beside the role a stored value has bits that say more.
+constexpr std::int32_t RoleBits = 0xff;
+
+/// The marker tracks from top to bottom.
+constexpr std::array MarkerTrackOrder{
+    TrackRole::Destination,  TrackRole::Insert,  TrackRole::DissolveWipe, TrackRole::AutomationWarning,
+    TrackRole::AudioSnippet, TrackRole::Overlap, TrackRole::Memos};
+
+} // namespace
+
+void Project::createMarkerTracks(IEditTransaction& transaction)
+{
+    findOrCreateTrack(transaction, m_folderTrack, TypeWord::Folder, TrackRole::Markers);
+    for (const std::int32_t role : MarkerTrackOrder) {
+        if (isMarkerRoleOn(role))
+            findOrCreateMarkerTrack(transaction, role);
+    }
+    // By these the copies in a preview are known again. What is copied keeps its id, so several memos may have the same.
+    if (hasPreviewOffset())
+        markerTrack(TrackRole::Memos).assignOwnIds(0.0, previewOffset() - timeOrigin());
+}
+
+void Project::createVideoTracks(IEditTransaction& transaction)
+{
+    if (m_model.videoList().isEmpty())
+        return;
+    Track video = newVideoTrack();
+    findOrCreateTrack(transaction, video, TypeWord::Video, TrackRole::NewVideo);
+}
+
+void Project::setTracksLocked(bool lock)
+{
+    const auto setLock = [lock](Track& track) {
+        if (track.isAlive())
+            track.setLock(lock);
+    };
+    FirstFailure failure;
+    for (Track& track : m_lockedTracks)
+        failure.ofStep([&] { setLock(track); });
+    for (std::int32_t role = TrackRole::Destination; role <= TrackRole::LastMarker; ++role) {
+        failure.ofStep([&] {
+            findTrack(markerTrack(role), TypeWord::Marker, role);
+            // The user goes on to write memos in a preview.
+            if (role != TrackRole::Memos)
+                setLock(markerTrack(role));
+        });
+    }
+    failure.ofStep([&] {
+        Track video = newVideoTrack();
+        findTrack(video, TypeWord::Video, TrackRole::NewVideo);
+        setLock(video);
+    });
+    failure.raise();
+}
+
+void Project::collectLockTracks()
+{
+    m_lockedTracks.clear();
+    const Track video = newVideoTrack();
+    for (const Track& track : cadrelTracks()) {
+        const bool isOwn = isMarkerTrack(track) || track == video;
+        if (!isOwn && isWanted(track) && !track.hostLocked())
+            m_lockedTracks.push_back(track);
+    }
+}
+
+void Project::findLockedTracks()
+{
+    for (const Track& track : cadrelTracks()) {
+        if (track.hasLockState() && std::ranges::find(m_lockedTracks, track) == m_lockedTracks.end())
+            m_lockedTracks.push_back(track);
+    }
+}
+
+bool Project::isMarkerTrack(const Track& track) const
+{
+    return std::ranges::find(m_markerTracks, track) != m_markerTracks.end();
+}
+
+Track Project::newVideoTrack()
+{
+    return m_videoProvider ? m_videoProvider->getTrackHandler().trackFor(VideoTrackHandler::Mode::New, true) : Track();
+}
+
+bool Project::isMarkerRoleOn(std::int32_t role) const
+{
+    const core::Settings& settings = m_model.settings();
+    switch (role) {
+    case TrackRole::Destination:
+        return settings.createDestinationMarkers();
+    case TrackRole::DissolveWipe:
+        return settings.createDissolveWipeMarkers();
+    case TrackRole::Insert:
+        return settings.createInsertMarkers();
+    case TrackRole::AutomationWarning:
+        return settings.createAutomationWarningMarkers();
+    case TrackRole::AudioSnippet:
+        return settings.createAudioSnippetMarkers();
+    case TrackRole::Overlap:
+        return settings.createOverlapMarkers();
+    default:
+        return true;
+    }
+}
+
+bool Project::findTrack(Track& slot, const char* word, std::int32_t role)
+{
+    if (slot.isAlive())
+        return true;
+    const std::vector<Track> candidates = tracksOfType(word);
+    const auto found =
+        std::ranges::find_if(candidates, [role](const Track& candidate) { return candidate.hasRole(role, RoleBits); });
+    if (found == candidates.end())
+        return false;
+    slot = *found;
+    return true;
+}
+
+void Project::findOrCreateTrack(IEditTransaction& transaction, Track& slot, const char* word, std::int32_t role)
+{
+    if (findTrack(slot, word, role))
+        return;
+    Track created = createTrack(word);
+    insertTrack(transaction, required(containerOf(nullptr)).get(), created, role);
+    slot = created;
+}
+
+void Project::findOrCreateMarkerTrack(IEditTransaction& transaction, std::int32_t role)
+{
+    const auto folder = required(query<IProjectNode>(m_folderTrack.node()));
+    Track& slot = markerTrack(role);
+    if (!findTrack(slot, TypeWord::Marker, role)) {
+        // The host may have one ready that nobody uses yet.
+        const auto unused = query<IProjectNode>(m_document->getDefaultMarkerTrack());
+        Track created = unused && !unused->getParent() ? Track(this, required(query<ITrackNode>(unused)).get())
+                                                       : createTrack(TypeWord::Marker);
+        insertTrack(transaction, m_folderTrack.container().get(), created, role);
+        slot = created;
+    } else if (required(query<IProjectNode>(slot.node()))->getParent() != folder.get()) {
+        requireOk(transaction.move(required(containerOf(nullptr)).get(), m_folderTrack.container().get(), slot.node()));
+    }
+}
+
+Track Project::createTrack(const char* word)
+{
+    const auto created = required(Counted<FUnknown>::adopt(m_document->createTrack(word)));
+    return Track(this, required(query<ITrackNode>(created)).get());
+}
+
+void Project::insertTrack(IEditTransaction& transaction, FUnknown* parent, Track& track, std::int32_t role)
+{
+    // Only what is in the project has a name in it.
+    requireOk(transaction.insert(parent, track.node()));
+    track.setName(TrackRole::nameOf(role));
+    track.setRole(role);
+    if (m_trackCache)
+        m_trackCache->push_back(Counted<ITrackNode>::share(track.node()));
+}
+
+} // namespace cadrel::host

@@ -1,0 +1,43 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/model/DataModelChangeCommand.h"
+#include "host/undo/DataModelEditStep.h"
+#include "velmark/Counted.h"
+#include "velmark/Editing.h"
+
+#include <string>
+
+namespace Velmark {
+class IProjectDocument;
+}
+
+namespace cadrel::host {
+
+/// Brings one change of the model into the host's undo list: it holds the state from before the change from its making on,
+/// and hands it to the transaction at its end. What the host refuses there is passed over, since nothing may be thrown.
+class DataModelChangeCommand : public core::DataModelChangeCommand {
+public:
+    /// A change that is an entry of the undo list by itself: begins the transaction, and commits it under the name at the
+    /// end. Throws Result::HostCallFailed when it can't begin; nothing is committed then.
+    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction, core::DataModel& model,
+                           Velmark::IProjectDocument* project);
+    /// A change within an open transaction, whose commit is somebody else's. `before` is the snapshot to go back to.
+    DataModelChangeCommand(Velmark::IEditTransaction& transaction, core::DataModel& model,
+                           Velmark::IProjectDocument* project, core::serialize::ByteArchive before);
+    ~DataModelChangeCommand() override;
+
+private:
+    /// The one that the others come down to.
+    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction, core::DataModel& model,
+                           Velmark::IProjectDocument* project, core::serialize::ByteArchive before, bool commitOnEnd);
+
+    Velmark::Counted<Velmark::IEditTransaction> m_transaction;
+    core::DataModel* m_model;
+    Velmark::IProjectDocument* m_project;
+    Velmark::Counted<DataModelEditStep> m_step;
+    bool m_commitOnEnd;
+};
+
+} // namespace cadrel::host

@@ -1,0 +1,19 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/undo/PreviewEventsStep.h"
+
+#include "host/border/HostFailure.h"
+
+#include <utility>
+
+namespace cadrel::host {
+
+Velmark::int32 PreviewEventsStep::swap()
+{
+    return resultOf([this] {
+        Events present = m_list.release();
+        m_list.append(std::exchange(m_other, std::move(present)));
+    });
+}
+
+} // namespace cadrel::host

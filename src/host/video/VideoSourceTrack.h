@@ -1,0 +1,47 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "gui/video/VideoTrackHandlerBase.h"
+#include "host/track/Track.h"
+
+#include <cstdint>
+
+namespace Velmark {
+class IEditTransaction;
+class IHostContext;
+} // namespace Velmark
+
+namespace cadrel::host {
+
+class PoolVideoSource;
+class VideoTrackHandler;
+
+/// Writes the videos of a source as events on a video track.
+class VideoSourceTrack : public gui::VideoTrackHandlerBase::Listener {
+public:
+    /// The track of that mode. All outlive this object.
+    VideoSourceTrack(Velmark::IHostContext* context, PoolVideoSource& source, VideoTrackHandler& handler,
+                     std::int32_t mode);
+    VideoSourceTrack(const VideoSourceTrack&) = delete;
+    VideoSourceTrack& operator=(const VideoSourceTrack&) = delete;
+    ~VideoSourceTrack() override;
+
+    /// How much later than in the list the videos are written, in seconds.
+    void setOffset(double seconds) { m_offset = seconds; }
+    /// Replaces what stands on the track by the videos of the list; does nothing for an empty one. A track on which the user
+    /// has put another video is left empty.
+    void writeVideoEvents(Velmark::IEditTransaction& transaction);
+
+    void tracksChanged() override;
+
+private:
+    Velmark::IHostContext* m_hostContext;
+    PoolVideoSource& m_source;
+    VideoTrackHandler& m_handler;
+    Track m_track;
+    std::int32_t m_mode;
+    double m_offset = 0.0;
+};
+
+} // namespace cadrel::host

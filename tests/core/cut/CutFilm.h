@@ -1,0 +1,113 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/cut/CadrelPreviewState.h"
+#include "core/cut/CadrelRunState.h"
+#include "core/cut/CutList.h"
+#include "core/detect/CadrelInformationAlgorithm.h"
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/settings/Settings.h"
+#include "tests/core/TestProject.h"
+#include "tests/core/conform/MemoryTrack.h"
+#include "tests/core/edl/EventMaking.h"
+
+#include <gtest/gtest.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <deque>
+#include <memory>
+#include <ostream>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace cadrel::core {
+
+/// Shows an entry where a test fails.
+inline void PrintTo(const MarkerEntry& entry, std::ostream* out)
+{
+    *out << entry.start << " to " << entry.end << " \"" << entry.name << "\" of kind " << entry.kind;
+}
+
+} // namespace cadrel::core
+
+namespace cadrel::tests {
+
+/// A film in conform: its EDLs, its tracks and its cuts.
+struct CutFilm {
+    explicit CutFilm(const core::Framerate& rate = core::Framerate(25, 0)) : project(rate) {}
+
+    MemoryTrack& addTrack(const std::wstring& name, bool isAudio = true) { return tracks.emplace_back(name, isAudio); }
+
+    /// Adds a cut whose change event has a place in the new programme; where it comes from doesn't matter to anyone.
+    core::EventBase& carryOver(const char* dstIn, const char* dstOut, core::Cut::CutEvents cutEvents = {})
+    {
+        const auto event = makeEvent("CHANGE", dstIn, dstOut, dstIn, dstOut);
+        cuts.add(std::make_shared<core::Cut>(event, std::move(cutEvents)));
+        return *event;
+    }
+    /// Adds a cut of which the cut events alone matter.
+    void addCut(core::Cut::CutEvents cutEvents) { carryOver("01:00:00:00", "01:00:10:00", std::move(cutEvents)); }
+
+    core::CadrelRunState runState() const { return {&oldEvents, &newEvents, project.framerate, &settings, 0.0}; }
+    core::CadrelPreviewState previewState() const { return {project.framerate, &settings}; }
+
+    std::vector<core::MarkerEntry> detectBy(const core::CadrelInformationAlgorithm& algorithm,
+                                            core::ProgressHandlerBase* progress = nullptr) const
+    {
+        return algorithm.detect(cuts, runState(), progress);
+    }
+
+    TestProject project;
+    core::EventList oldEvents{core::ListKind::Old};
+    core::EventList newEvents{core::ListKind::New};
+    std::deque<MemoryTrack> tracks;
+    core::CutList cuts;
+    core::Settings settings;
+};
+
+inline std::shared_ptr<core::CutEventBase> cutEvent(MemoryTrack& track, core::SecondsRange source,
+                                                    core::SecondsRange destination)
+{
+    return std::make_shared<MemoryCutEvent>(track, source.start, source.end, destination.start, destination.end);
+}
+
+inline void addClip(MemoryTrack& track, double start, double end)
+{
+    track.addClip({"take", start, end, 0.0});
+}
+
+/// A plain event of roll "ROLL" and clip "CLIP" at a place of the programme, in frames of the project's rate.
+inline std::shared_ptr<core::EventBase> eventAtFrames(std::int32_t dstIn, std::int32_t dstOut)
+{
+    auto event = std::make_shared<core::EventBase>();
+    event->setRollName("ROLL");
+    event->setClipName("CLIP");
+    const core::Timecode in(dstIn);
+    const core::Timecode out(dstOut);
+    event->setTimecodes(in, out, in, out);
+    return event;
+}
+
+/// The same entries, with times as close as floats allow that were reckoned by different roads.
+inline void expectEntries(const std::vector<core::MarkerEntry>& found, const std::vector<core::MarkerEntry>& expected)
+{
+    ASSERT_EQ(found.size(), expected.size()) << testing::PrintToString(found);
+    for (std::size_t i = 0; i < found.size(); ++i) {
+        EXPECT_NEAR(found[i].start, expected[i].start, 1e-9) << "entry " << i;
+        EXPECT_NEAR(found[i].end, expected[i].end, 1e-9) << "entry " << i;
+        EXPECT_EQ(found[i].name, expected[i].name) << "entry " << i;
+        EXPECT_EQ(found[i].kind, expected[i].kind) << "entry " << i;
+    }
+}
+
+/// The calls of a progress that is told so many single steps and asked nothing.
+inline std::vector<std::wstring> singleTicks(std::size_t count)
+{
+    return std::vector<std::wstring>(count, L"tick 1");
+}
+
+} // namespace cadrel::tests

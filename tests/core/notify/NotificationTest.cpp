@@ -1,0 +1,289 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notify/ChangeContext.h"
+#include "core/notify/ChangeContextListenerInterface.h"
+#include "core/notify/ChangeContextNotificationBase.h"
+
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "tests/core/ThrownResult.h"
+#include "tests/core/notify/RecordingListener.h"
+#include "util/Result.h"
+
+#include <gtest/gtest.h>
+
+#include <array>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <utility>
+#include <vector>
+
+using cadrel::core::ActionChangeContext;
+using cadrel::core::ChangeContext;
+using cadrel::core::ChangeContextListenerInterface;
+using cadrel::core::ChangeContextNotificationBase;
+using cadrel::core::DataModelChangeContext;
+using cadrel::core::EventChangeContext;
+using cadrel::core::EventListChangeContext;
+using cadrel::tests::RecordingListener;
+using cadrel::tests::thrownBy;
+using cadrel::util::Result;
+
+namespace {
+
+/// Does something when it hears of a change.
+class ActingListener : public ChangeContextListenerInterface {
+public:
+    explicit ActingListener(std::function<void()> action = nullptr) : m_action(std::move(action)) {}
+
+    void onChange(const ChangeContext&) override { m_action(); }
+
+private:
+    std::function<void()> m_action;
+};
+
+const ChangeContext SettingsChange(ChangeContext::SettingsChanged);
+
+} // namespace
+
+TEST(ChangeContext, HasTheFixedTypes)
+{
+    EXPECT_EQ(ChangeContext::DataModelChanged, 0);
+    EXPECT_EQ(ChangeContext::SettingsChanged, 1);
+    EXPECT_EQ(ChangeContext::EventListChanged, 2);
+    EXPECT_EQ(ChangeContext::EventChanged, 3);
+    EXPECT_EQ(ChangeContext::VideoListChanged, 4);
+    EXPECT_EQ(ChangeContext::PreviewStateChanged, 5);
+    EXPECT_EQ(ChangeContext::ActionFinished, 6);
+}
+
+TEST(ChangeContext, OfEachClassHasItsTypeAndField)
+{
+    EXPECT_EQ(ChangeContext(ChangeContext::VideoListChanged).type, 4);
+    EXPECT_EQ(DataModelChangeContext(nullptr).type, 0);
+    EXPECT_EQ(DataModelChangeContext(nullptr).dataModel, nullptr);
+    EXPECT_EQ(EventListChangeContext(1).type, 2);
+    EXPECT_EQ(EventListChangeContext(1).listKind, 1);
+    EXPECT_EQ(EventChangeContext().type, 3);
+    EXPECT_EQ(ActionChangeContext(1).type, 6);
+    EXPECT_EQ(ActionChangeContext(1).action, 1);
+}
+
+TEST(Notification, DoesNothingWithoutListeners)
+{
+    ChangeContextNotificationBase notifier;
+
+    EXPECT_NO_THROW(notifier.notify(SettingsChange));
+}
+
+TEST(Notification, HandsTheVeryContextToEveryListener)
+{
+    ChangeContextNotificationBase notifier;
+    RecordingListener first;
+    RecordingListener second;
+    notifier.addListener(&first);
+    notifier.addListener(&second);
+
+    notifier.notify(SettingsChange);
+
+    EXPECT_EQ(first.contexts, std::vector<const ChangeContext*>{&SettingsChange});
+    EXPECT_EQ(second.contexts, std::vector<const ChangeContext*>{&SettingsChange});
+}
+
+TEST(Notification, HasArrivedWhenNotifyReturns)
+{
+    ChangeContextNotificationBase notifier;
+    RecordingListener listener;
+    notifier.addListener(&listener);
+
+    notifier.notify(SettingsChange);
+    const std::size_t afterTheFirst = listener.types.size();
+    notifier.notify(SettingsChange);
+
+    EXPECT_EQ(afterTheFirst, 1U);
+    EXPECT_EQ(listener.types.size(), 2U);
+}
+
+TEST(Notification, ArrivesOnceAtAListenerThatWasAddedTwice)
+{
+    ChangeContextNotificationBase notifier;
+    RecordingListener listener;
+    notifier.addListener(&listener);
+    notifier.addListener(&listener);
+
+    notifier.notify(SettingsChange);
+
+    EXPECT_EQ(listener.types.size(), 1U);
+}
+
+TEST(Notification, NoLongerArrivesAtARemovedListener)
+{
+    ChangeContextNotificationBase notifier;
+    RecordingListener removed;
+    RecordingListener kept;
+    notifier.addListener(&removed);
+    notifier.addListener(&kept);
+
+    notifier.removeListener(&removed);
+    notifier.notify(SettingsChange);
+
+    EXPECT_TRUE(removed.types.empty());
+    EXPECT_EQ(kept.types.size(), 1U);
+}
+
+TEST(Notification, IsGoneAfterOneRemovalOfAListenerThatWasAddedTwice)
+{
+    ChangeContextNotificationBase notifier;
+    RecordingListener listener;
+    notifier.addListener(&listener);
+    notifier.addListener(&listener);
+
+    notifier.removeListener(&listener);
+    notifier.notify(SettingsChange);
+
+    EXPECT_TRUE(listener.types.empty());
+}
+
+TEST(Notification, TakesTheRemovalOfAListenerThatIsNotThere)
+{
+    ChangeContextNotificationBase notifier;
+    RecordingListener listener;
+    RecordingListener other;
+    notifier.addListener(&listener);
+    notifier.addListener(&other);
+
+    notifier.removeListener(&listener);
+    notifier.removeListener(&listener);
+    notifier.notify(SettingsChange);
+
+    EXPECT_TRUE(listener.types.empty());
+    EXPECT_EQ(other.types.size(), 1U);
+}
+
+TEST(Notification, GoesInTheOrderOfTheListenersAddresses)
+{
+    ChangeContextNotificationBase notifier;
+    std::vector<int> order;
+    std::array<ActingListener, 3> listeners = {ActingListener([&] { order.push_back(0); }),
+                                               ActingListener([&] { order.push_back(1); }),
+                                               ActingListener([&] { order.push_back(2); })};
+    notifier.addListener(&listeners[1]);
+    notifier.addListener(&listeners[2]);
+    notifier.addListener(&listeners[0]);
+
+    notifier.notify(SettingsChange);
+
+    EXPECT_EQ(order, (std::vector<int>{0, 1, 2}));
+}
+
+TEST(Notification, ReachesEachListenerOnceInOrderAlsoWhereOthersComeAndGoMeanwhile)
+{
+    using cadrel::core::EventList;
+    std::vector<int> order;
+    EventList list;
+    const auto event = std::make_shared<cadrel::core::EventBase>();
+    list.add(event);
+    // Temporary lists listen to the event from addresses before, between and behind those of its listeners.
+    struct Neighbours {
+        std::optional<EventList> before;
+        ActingListener first;
+        std::optional<EventList> between;
+        ActingListener second;
+        std::optional<EventList> behind;
+        ActingListener third;
+    };
+    Neighbours at;
+    const auto actAs = [&](int number) {
+        return ActingListener([&, number] {
+            order.push_back(number);
+            for (std::optional<EventList>* place : {&at.before, &at.between, &at.behind})
+                place->emplace(list);
+            for (std::optional<EventList>* place : {&at.behind, &at.before, &at.between})
+                place->reset();
+            const EventList onTheStack(list);
+            const auto onTheHeap = std::make_unique<EventList>(list);
+        });
+    };
+    at.first = actAs(1);
+    at.second = actAs(2);
+    at.third = actAs(3);
+    for (ActingListener* listener : {&at.third, &at.first, &at.second})
+        event->addListener(listener);
+    RecordingListener ofTheList;
+    list.addListener(&ofTheList);
+
+    event->setClipName("changed");
+
+    EXPECT_EQ(order, (std::vector<int>{1, 2, 3}));
+    EXPECT_EQ(ofTheList.types, std::vector<std::int32_t>{ChangeContext::EventListChanged});
+}
+
+TEST(Notification, ReachesEachListenerThatStaysOnceWhereOneRemovesItselfMeanwhile)
+{
+    for (const std::size_t leaving : {0U, 1U, 2U}) {
+        ChangeContextNotificationBase notifier;
+        std::vector<std::size_t> order;
+        std::array<ActingListener, 3> listeners;
+        for (std::size_t i = 0; i < listeners.size(); ++i) {
+            listeners[i] = ActingListener([&, i] {
+                order.push_back(i);
+                if (i == leaving)
+                    notifier.removeListener(&listeners[i]);
+            });
+            notifier.addListener(&listeners[i]);
+        }
+
+        notifier.notify(SettingsChange);
+        EXPECT_EQ(order, (std::vector<std::size_t>{0, 1, 2})) << leaving;
+
+        order.clear();
+        notifier.notify(SettingsChange);
+        std::vector<std::size_t> staying = {0, 1, 2};
+        std::erase(staying, leaving);
+        EXPECT_EQ(order, staying) << leaving;
+    }
+}
+
+TEST(Notification, EndsAtAListenerThatThrows)
+{
+    ChangeContextNotificationBase notifier;
+    int heard = 0;
+    std::array<ActingListener, 3> listeners = {ActingListener([&] { ++heard; }),
+                                               ActingListener([] { throw Result::Refused; }),
+                                               ActingListener([&] { ++heard; })};
+    for (ActingListener& listener : listeners)
+        notifier.addListener(&listener);
+
+    EXPECT_EQ(thrownBy([&] { notifier.notify(SettingsChange); }), Result::Refused);
+    EXPECT_EQ(heard, 1);
+}
+
+TEST(Notification, OfACopyReachesNobody)
+{
+    ChangeContextNotificationBase notifier;
+    RecordingListener listener;
+    notifier.addListener(&listener);
+
+    ChangeContextNotificationBase copy = notifier;
+    copy.notify(SettingsChange);
+
+    EXPECT_TRUE(listener.types.empty());
+}
+
+TEST(Notification, ReachesTheOwnListenersAfterAnAssignment)
+{
+    ChangeContextNotificationBase notifier;
+    ChangeContextNotificationBase other;
+    RecordingListener listener;
+    RecordingListener ofTheOther;
+    notifier.addListener(&listener);
+    other.addListener(&ofTheOther);
+
+    notifier = other;
+    notifier.notify(SettingsChange);
+
+    EXPECT_EQ(listener.types.size(), 1U);
+    EXPECT_TRUE(ofTheOther.types.empty());
+}

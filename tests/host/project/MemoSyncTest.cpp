@@ -1,0 +1,1013 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/project/MemoSync.h"
+
+#include "core/cut/Cut.h"
+#include "host/border/HostFailure.h"
+#include "host/project/Project.h"
+#include "tests/core/TestProject.h"
+#include "tests/core/ThrownResult.h"
+#include "tests/core/edl/EventMaking.h"
+#include "tests/host/track/TrackHost.h"
+#include "velmark/Attributes.h"
+#include "velmark/Module.h"
+#include "velmark/String.h"
+
+#include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
+
+#include <algorithm>
+#include <cmath>
+#include <functional>
+#include <map>
+#include <numeric>
+#include <sstream>
+#include <string>
+#include <tuple>
+#include <utility>
+#include <vector>
+
+using namespace Velmark;
+using cadrel::tests::makeEvent;
+using cadrel::tests::thrownBy;
+using cadrel::util::Result;
+using standin::tests::childrenOf;
+using standin::tests::text;
+
+namespace cadrel::host {
+
+using tests::TrackHost;
+
+namespace {
+
+using Content = std::vector<std::string>;
+
+/// A transaction in which nothing can be done.
+class RefusingTransaction : public Implements<RefusingTransaction, FObject, IEditTransaction> {
+public:
+    static constexpr const char* ClassName = "RefusingTransaction";
+
+    int32 begin(bool) override { return ResultFalse; }
+    int32 commit(IProjectDocument*, const char16_t*) override { return ResultFalse; }
+    int32 insert(FUnknown*, FUnknown*) override { return ResultFalse; }
+    int32 remove(FUnknown*, FUnknown*) override { return ResultFalse; }
+    int32 move(FUnknown*, FUnknown*, FUnknown*) override { return ResultFalse; }
+    int32 copyAll(IProjectDocument*, FUnknown**, double, double, int32) override { return ResultFalse; }
+    int32 paste(IProjectDocument*, FUnknown*, int32, double) override { return ResultFalse; }
+    int32 deleteRange(IProjectDocument*, int32, double, double) override { return ResultFalse; }
+    int32 addStep(IEditStep*) override { return ResultFalse; }
+};
+
+/// The film begins at 01:00:00:00, where the clock of the project begins itself or an hour later. The tests give seconds of
+/// the film, and in the preview those of its copy.
+///
+///     film       |----- 10 ===== 20 --------------- 30 ===== 40 -----
+///                         source                     destination
+class PreviewedMemos {
+public:
+    static constexpr double Day = 86400.0;
+
+    explicit PreviewedMemos(double origin) : hook(makeCounted<standin::tests::Recorder>(calls)), host(origin)
+    {
+        hook->whenCalled = [this](const std::string& call) {
+            if (call == "edited")
+                followed = thrownBy([this] { host.adapter.onProjectEdited(*host.transaction()); });
+        };
+        requireOk(service<IProjectManager>(host.context())->addNotification(hook.get()));
+
+        host.adapter.computePreviewOffset();
+        createMarkerTracks();
+        memos = query<IProjectNode>(host.adapter.tracksOfType(TypeWord::Marker).back().node());
+    }
+    PreviewedMemos(const PreviewedMemos&) = delete;
+    PreviewedMemos& operator=(const PreviewedMemos&) = delete;
+    ~PreviewedMemos() { service<IProjectManager>(host.context())->removeNotification(hook.get()); }
+
+    void createMarkerTracks()
+    {
+        host.edit(u"Tracks", [&] { host.adapter.createMarkerTracks(*host.transaction()); });
+    }
+
+    /// In the host's seconds.
+    double film(double seconds) const { return 3600.0 + seconds - host.origin; }
+
+    TrackHost::Node addMemo(const char16_t* name, double start, double end)
+    {
+        return host.addRangeMarker(memos, name, film(start), film(end));
+    }
+    TrackHost::Node addMemo(const char16_t* name, double time) { return host.addPointMarker(memos, name, film(time)); }
+
+    /// A memo in the preview, as the user writes it.
+    TrackHost::Node addCopy(const char16_t* name, double start, double end)
+    {
+        return addMemo(name, Day + start, Day + end);
+    }
+    TrackHost::Node addCopy(const char16_t* name, double time) { return addMemo(name, Day + time); }
+
+    static std::shared_ptr<core::EventBase> event(const char* srcIn, const char* srcOut, const char* dstIn,
+                                                  const char* dstOut)
+    {
+        return makeEvent("A012", srcIn, srcOut, dstIn, dstOut, 1);
+    }
+    static std::shared_ptr<core::EventBase> tenSeconds()
+    {
+        return event("01:00:10:00", "01:00:20:00", "01:00:30:00", "01:00:40:00");
+    }
+
+    /// Previews the events, one after the other, and lets the user look at them.
+    void preview(const std::vector<std::shared_ptr<core::EventBase>>& events)
+    {
+        host.adapter.model().settings().setCreateDestinationMarkers(false);
+        host.edit(u"Preview", [&] {
+            host.adapter.createMarkerTracks(*host.transaction());
+            for (const auto& previewed : events)
+                host.adapter.processCut(*host.transaction(), *host.adapter.makeCut(previewed));
+        });
+        for (const auto& previewed : events)
+            host.adapter.previewEvents().add(previewed);
+        host.adapter.model().setPreviewActive(true);
+        host.adapter.onProjectChanged();
+    }
+
+    /// The copy of that name in the preview, the first of several.
+    TrackHost::Node copyOf(const char16_t* name, int which = 0)
+    {
+        for (const auto& memo : childrenOf(*memos)) {
+            if (memo->getStart(nullptr) + host.origin >= Day && std::u16string(memo->getName()) == name && which-- == 0)
+                return memo;
+        }
+        return nullptr;
+    }
+    TrackHost::Node memoOf(const char16_t* name)
+    {
+        for (const auto& memo : childrenOf(*memos)) {
+            if (std::u16string(memo->getName()) == name)
+                return memo;
+        }
+        return nullptr;
+    }
+    std::int64_t idOf(const TrackHost::Node& memo) { return HostEvent(host.handle(memos), memo).getUserId(); }
+
+    // What the user does in the preview.
+    void move(const TrackHost::Node& copy, double start)
+    {
+        host.edit(u"Move", [&] { requireOk(copy->setStart(nullptr, 0, film(Day + start))); });
+    }
+    void resize(const TrackHost::Node& copy, double start, double end)
+    {
+        host.edit(u"Resize", [&] {
+            requireOk(copy->setStart(nullptr, 0, film(Day + start)));
+            requireOk(copy->setEnd(nullptr, 0, film(Day + end)));
+        });
+    }
+    void rename(const TrackHost::Node& copy, const char16_t* name)
+    {
+        host.edit(u"Rename", [&] { requireOk(copy->setName(nullptr, text(name).get(), 0)); });
+    }
+    void remove(const TrackHost::Node& copy)
+    {
+        host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), copy.get())); });
+    }
+
+    /// The memos of the real programme, "name start-end"; of a point "name time". To the thousandth.
+    Content film() { return content(0.0, Day - 3600.0); }
+    /// Their copies.
+    Content copies() { return content(Day, 2.0 * Day); }
+
+    std::vector<std::string> calls;
+    Counted<standin::tests::Recorder> hook;
+    /// What became of the last edit.
+    Result::Type followed = Result::Ok;
+    cadrel::tests::TestProject timecodes;
+    TrackHost host;
+    TrackHost::Node memos;
+
+private:
+    Content content(double from, double to)
+    {
+        Content found;
+        for (const auto& memo : childrenOf(*memos)) {
+            const double start = memo->getStart(nullptr);
+            if (start < film(from) || start >= film(to))
+                continue;
+            std::ostringstream line;
+            line << ConstString(memo->getName()).text8() << " " << rounded(start - film(from));
+            if (memo->isType(TypeWord::Range))
+                line << "-" << rounded(memo->getEnd(nullptr) - film(from));
+            found.push_back(line.str());
+        }
+        return found;
+    }
+    static double rounded(double seconds) { return std::round(seconds * 1000.0) / 1000.0; }
+};
+
+class MemoSyncTest : public testing::TestWithParam<double>, protected PreviewedMemos {
+protected:
+    MemoSyncTest() : PreviewedMemos(GetParam()) {}
+};
+
+INSTANTIATE_TEST_SUITE_P(Origins, MemoSyncTest, testing::Values(0.0, 3600.0));
+
+} // namespace
+
+TEST_P(MemoSyncTest, APreviewShowsTheMemosOfItsSource)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    addMemo(u"cue", 17.0);
+    addMemo(u"elsewhere", 50.0);
+
+    preview({tenSeconds()});
+
+    EXPECT_EQ(film(), (Content{"loud 12-15", "cue 17", "elsewhere 50"}));
+    EXPECT_EQ(copies(), (Content{"loud 32-35", "cue 37"}));
+    EXPECT_EQ(idOf(copyOf(u"loud")), idOf(memoOf(u"loud")));
+}
+
+TEST_P(MemoSyncTest, AMemoFollowsItsCopyThatMoves)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    addMemo(u"cue", 17.0);
+    addMemo(u"elsewhere", 50.0);
+    preview({tenSeconds()});
+
+    move(copyOf(u"loud"), 33.0);
+    EXPECT_EQ(film(), (Content{"loud 13-16", "cue 17", "elsewhere 50"}));
+
+    move(copyOf(u"cue"), 31.5);
+    EXPECT_EQ(film(), (Content{"cue 11.5", "loud 13-16", "elsewhere 50"}));
+    EXPECT_EQ(copies(), (Content{"cue 31.5", "loud 33-36"}));
+    EXPECT_EQ(followed, Result::Ok);
+}
+
+TEST_P(MemoSyncTest, AMemoFollowsTheLengthOfItsCopy)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    preview({tenSeconds()});
+
+    resize(copyOf(u"loud"), 31.0, 38.0);
+
+    EXPECT_EQ(film(), Content{"loud 11-18"});
+}
+
+TEST_P(MemoSyncTest, AMemoFollowsTheNameOfItsCopy)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    addMemo(u"cue", 17.0);
+    preview({tenSeconds()});
+
+    rename(copyOf(u"cue"), u"gunshot");
+
+    EXPECT_EQ(film(), (Content{"loud 12-15", "gunshot 17"}));
+}
+
+TEST_P(MemoSyncTest, AMemoGoesWithItsCopy)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    addMemo(u"cue", 17.0);
+    addMemo(u"elsewhere", 50.0);
+    preview({tenSeconds()});
+
+    remove(copyOf(u"loud"));
+
+    EXPECT_EQ(film(), (Content{"cue 17", "elsewhere 50"}));
+}
+
+TEST_P(MemoSyncTest, WhatIsWrittenInThePreviewIsWrittenInTheFilm)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    preview({tenSeconds()});
+
+    addCopy(u"room tone", 36.0, 39.0);
+    addCopy(u"splash", 31.0);
+
+    EXPECT_EQ(film(), (Content{"splash 11", "loud 12-15", "room tone 16-19"}));
+    EXPECT_EQ(idOf(memoOf(u"loud")), 1);
+    EXPECT_EQ(idOf(memoOf(u"room tone")), 2);
+    EXPECT_EQ(idOf(copyOf(u"room tone")), 2);
+    EXPECT_EQ(idOf(memoOf(u"splash")), 3);
+    EXPECT_EQ(idOf(copyOf(u"splash")), 3);
+    FVariant reel;
+    EXPECT_EQ(memoOf(u"splash")->getAttribute(AttributeKey::Reel, reel), ResultOk);
+    EXPECT_STREQ(reel.asString(), "");
+}
+
+TEST_P(MemoSyncTest, WhatWasWrittenInThePreviewIsFollowedFromThenOn)
+{
+    preview({tenSeconds()});
+    addCopy(u"splash", 31.0);
+
+    move(copyOf(u"splash"), 33.0);
+    EXPECT_EQ(film(), Content{"splash 13"});
+
+    remove(copyOf(u"splash"));
+    EXPECT_EQ(film(), Content());
+}
+
+TEST_P(MemoSyncTest, TheCopyOfACopyIsAMemoOfItsOwn)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+
+    // Attributes travel with what is copied.
+    host.edit(u"Paste", [&] {
+        const auto pasted = addCopy(u"cue", 38.0);
+        HostEvent(host.handle(memos), pasted).setUserId(idOf(memoOf(u"cue")));
+    });
+
+    EXPECT_EQ(film(), (Content{"cue 12", "cue 18"}));
+    EXPECT_NE(idOf(copyOf(u"cue", 0)), idOf(copyOf(u"cue", 1)));
+}
+
+TEST_P(MemoSyncTest, TheEditAndWhatFollowsAreOneEntryOfTheUndoList)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    const std::string before = host.dump();
+    move(copyOf(u"cue"), 38.0);
+    const std::string behind = host.dump();
+
+    EXPECT_TRUE(host.undo());
+    EXPECT_EQ(host.dump(), before);
+    EXPECT_TRUE(host.redo());
+    EXPECT_EQ(host.dump(), behind);
+    EXPECT_EQ(film(), Content{"cue 18"});
+}
+
+TEST_P(MemoSyncTest, FollowsAfterAnUndo)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"loud", 15.0);
+    preview({tenSeconds()});
+    move(copyOf(u"cue"), 38.0);
+    host.undo();
+
+    rename(copyOf(u"loud"), u"louder");
+
+    EXPECT_EQ(film(), (Content{"cue 12", "louder 15"}));
+}
+
+TEST_P(MemoSyncTest, NothingFollowsWithoutPreview)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    host.adapter.model().setPreviewActive(false);
+
+    remove(copyOf(u"cue"));
+    EXPECT_EQ(film(), Content{"cue 12"});
+
+    host.adapter.model().setPreviewActive(true);
+    host.adapter.resetPreviewOffset();
+    addCopy(u"splash", 31.0);
+    EXPECT_EQ(film(), Content{"cue 12"});
+    EXPECT_EQ(followed, Result::Ok);
+}
+
+TEST_P(MemoSyncTest, NothingFollowsWhereNothingIsPreviewed)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    host.adapter.previewEvents().clear();
+
+    remove(copyOf(u"cue"));
+
+    EXPECT_EQ(film(), Content{"cue 12"});
+}
+
+TEST_P(MemoSyncTest, AnEditOfOtherTracksTouchesNoMemo)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    // What is edited past the system is not followed until the memos change again.
+    host.adapter.model().setPreviewActive(false);
+    move(copyOf(u"cue"), 38.0);
+    host.adapter.model().setPreviewActive(true);
+
+    host.addTrack(TypeWord::Audio, u"FX");
+    EXPECT_EQ(film(), Content{"cue 12"});
+}
+
+TEST_P(MemoSyncTest, FindsTheMemosOfAProjectThatWasOpenedAnew)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    Project reopened(host.context(), host.document(), nullptr);
+    reopened.computePreviewOffset();
+    reopened.model().setProperty(core::PropertyKey::PreviewOffset, core::Variant(Day));
+    reopened.model().setPreviewActive(true);
+    reopened.previewEvents().add(tenSeconds());
+    hook->whenCalled = [&](const std::string& call) {
+        if (call == "edited")
+            reopened.onProjectEdited(*host.transaction());
+    };
+
+    move(copyOf(u"cue"), 38.0);
+
+    EXPECT_EQ(film(), Content{"cue 18"});
+}
+
+TEST_P(MemoSyncTest, NewMemosOfTheFilmGetAnId)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+
+    const auto added = addMemo(u"later", 50.0);
+
+    EXPECT_EQ(idOf(added), 2);
+}
+
+TEST_P(MemoSyncTest, WhatIsWrittenInTheFilmMeanwhileStays)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+
+    addMemo(u"splash", 14.0);
+    EXPECT_EQ(film(), (Content{"cue 12", "splash 14"}));
+
+    move(copyOf(u"cue"), 33.0);
+    EXPECT_EQ(film(), (Content{"cue 13", "splash 14"}));
+
+    addCopy(u"gunshot", 35.0);
+    EXPECT_EQ(film(), (Content{"cue 13", "splash 14", "gunshot 15"}));
+
+    remove(copyOf(u"cue"));
+    EXPECT_EQ(film(), (Content{"splash 14", "gunshot 15"}));
+}
+
+TEST_P(MemoSyncTest, AMemoThatHangsOverAnEdgeKeepsWhatIsNotInThePreview)
+{
+    addMemo(u"in", 8.0, 15.0);
+    addMemo(u"out", 17.0, 22.0);
+    addMemo(u"cue", 16.0);
+    preview({tenSeconds()});
+    ASSERT_EQ(copies(), (Content{"in 30-35", "cue 36", "out 37-40"}));
+
+    rename(copyOf(u"cue"), u"gunshot");
+    EXPECT_EQ(film(), (Content{"in 8-15", "gunshot 16", "out 17-22"}));
+
+    resize(copyOf(u"in"), 30.0, 34.0);
+    EXPECT_EQ(film(), (Content{"in 8-14", "gunshot 16", "out 17-22"}));
+
+    resize(copyOf(u"in"), 32.0, 34.0);
+    EXPECT_EQ(film(), (Content{"in 12-14", "gunshot 16", "out 17-22"}));
+}
+
+TEST_P(MemoSyncTest, AMemoThatOnlyReachesInIsNoOther)
+{
+    addMemo(u"in", 2.0, 12.0);
+    addMemo(u"out", 19.0, 29.0);
+    addMemo(u"cue", 16.0);
+    preview({tenSeconds()});
+    ASSERT_EQ(copies(), (Content{"in 30-32", "cue 36", "out 39-40"}));
+
+    move(copyOf(u"cue"), 35.0);
+    EXPECT_EQ(film(), (Content{"in 2-12", "cue 15", "out 19-29"}));
+
+    resize(copyOf(u"out"), 38.0, 40.0);
+    EXPECT_EQ(film(), (Content{"in 2-12", "cue 15", "out 18-29"}));
+
+    remove(copyOf(u"in"));
+    EXPECT_EQ(film(), (Content{"in 2-12", "cue 15", "out 18-29"}));
+}
+
+TEST_P(MemoSyncTest, AMemoAtTheEndOfTheSourceIsNotInThePreview)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"cut", 20.0);
+    preview({tenSeconds()});
+    ASSERT_EQ(copies(), Content{"cue 32"});
+
+    move(copyOf(u"cue"), 33.0);
+
+    EXPECT_EQ(film(), (Content{"cue 13", "cut 20"}));
+}
+
+TEST_P(MemoSyncTest, AMemoCanMoveToTheStretchOfAnotherEvent)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds(), event("01:00:50:00", "01:01:00:00", "01:00:40:00", "01:00:50:00")});
+
+    move(copyOf(u"cue"), 43.0);
+
+    EXPECT_EQ(film(), Content{"cue 53"});
+}
+
+TEST_P(MemoSyncTest, OfTwoEventsWithTheSameSourceTheOneThatWasEditedIsFollowed)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds(), event("01:00:10:00", "01:00:20:00", "01:01:00:00", "01:01:10:00")});
+    ASSERT_EQ(copies(), (Content{"cue 32", "cue 62"}));
+
+    addCopy(u"splash", 34.0);
+    EXPECT_EQ(film(), (Content{"cue 12", "splash 14"}));
+
+    rename(copyOf(u"cue", 0), u"gunshot");
+    EXPECT_EQ(film(), (Content{"gunshot 12", "splash 14"}));
+
+    move(copyOf(u"cue"), 65.0);
+    EXPECT_EQ(film(), (Content{"splash 14", "gunshot 15"}));
+
+    remove(copyOf(u"gunshot"));
+    EXPECT_EQ(film(), Content{"splash 14"});
+}
+
+TEST_P(MemoSyncTest, ACopyThatIsNotEditedChangesNothing)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"loud", 14.0, 16.0);
+    preview({tenSeconds(), event("01:00:10:00", "01:00:20:00", "01:01:00:00", "01:01:10:00")});
+
+    rename(copyOf(u"cue", 0), u"gunshot");
+    move(copyOf(u"loud", 1), 65.0);
+    EXPECT_EQ(film(), (Content{"gunshot 12", "loud 15-17"}));
+
+    remove(copyOf(u"gunshot"));
+    EXPECT_EQ(film(), Content{"loud 15-17"});
+
+    remove(copyOf(u"loud", 1));
+    EXPECT_EQ(film(), Content());
+    EXPECT_EQ(copies(), (Content{"loud 34-36", "cue 62"}));
+}
+
+TEST_P(MemoSyncTest, AMemoThatIsResizedOverAnEdgeReachesToTheEdge)
+{
+    addMemo(u"splash", 11.0, 12.0);
+    addMemo(u"loud", 18.0, 19.0);
+    preview({tenSeconds()});
+
+    resize(copyOf(u"loud"), 38.0, 43.0);
+    EXPECT_EQ(film(), (Content{"splash 11-12", "loud 18-20"}));
+
+    resize(copyOf(u"splash"), 27.0, 32.0);
+    EXPECT_EQ(film(), (Content{"splash 10-12", "loud 18-20"}));
+
+    resize(copyOf(u"loud"), 38.0, 39.5);
+    EXPECT_EQ(film(), (Content{"splash 10-12", "loud 18-19.5"}));
+
+    remove(copyOf(u"splash"));
+    EXPECT_EQ(film(), Content{"loud 18-19.5"});
+}
+
+TEST_P(MemoSyncTest, AMemoThatIsDraggedOverAnEdgeKeepsWhatIsSeenOfIt)
+{
+    addMemo(u"loud", 15.0, 19.0);
+    preview({tenSeconds()});
+
+    move(copyOf(u"loud"), 38.5);
+    EXPECT_EQ(film(), Content{"loud 18.5-20"});
+
+    move(copyOf(u"loud"), 28.0);
+    EXPECT_EQ(film(), Content{"loud 10-12"});
+}
+
+TEST_P(MemoSyncTest, AMemoThatIsDraggedOutOfThePreviewStaysUntilItComesBack)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    addMemo(u"cue", 19.0);
+    preview({tenSeconds()});
+
+    move(copyOf(u"cue"), 41.0);
+    EXPECT_EQ(film(), (Content{"loud 12-15", "cue 19"}));
+
+    move(copyOf(u"loud"), 20.0);
+    EXPECT_EQ(film(), (Content{"loud 12-15", "cue 19"}));
+
+    move(copyOf(u"cue"), 36.0);
+    EXPECT_EQ(film(), (Content{"loud 12-15", "cue 16"}));
+
+    move(copyOf(u"cue"), 40.0);
+    EXPECT_EQ(film(), (Content{"loud 12-15", "cue 16"})) << "What is copied doesn't hold its end.";
+
+    remove(copyOf(u"cue"));
+    remove(copyOf(u"loud"));
+    EXPECT_EQ(film(), (Content{"loud 12-15", "cue 16"})) << "Outside of the preview nothing is followed.";
+}
+
+TEST_P(MemoSyncTest, AMemoThatWasRenamedOutsideOfThePreviewBringsItsNameBack)
+{
+    addMemo(u"cue", 19.0);
+    preview({tenSeconds()});
+
+    move(copyOf(u"cue"), 41.0);
+    rename(copyOf(u"cue"), u"gunshot");
+    EXPECT_EQ(film(), Content{"cue 19"});
+
+    move(copyOf(u"gunshot"), 36.0);
+    EXPECT_EQ(film(), Content{"gunshot 16"});
+}
+
+TEST_P(MemoSyncTest, WhatIsWrittenOverAnEdgeReachesToTheEdge)
+{
+    preview({tenSeconds()});
+
+    addCopy(u"long", 38.0, 43.0);
+    addCopy(u"early", 25.0, 31.0);
+    EXPECT_EQ(film(), (Content{"early 10-11", "long 18-20"}));
+    EXPECT_EQ(idOf(memoOf(u"long")), idOf(copyOf(u"long")));
+
+    rename(copyOf(u"long"), u"longer");
+    EXPECT_EQ(film(), (Content{"early 10-11", "longer 18-20"}));
+}
+
+TEST_P(MemoSyncTest, AMemoOverSeveralStretchesBelongsToTheFirst)
+{
+    preview({tenSeconds(), event("01:00:50:00", "01:01:00:00", "01:00:40:00", "01:00:50:00")});
+
+    addCopy(u"both", 38.0, 42.0);
+    addCopy(u"wide", 31.0, 49.0);
+    EXPECT_EQ(film(), (Content{"wide 11-20", "both 18-20"}));
+
+    rename(copyOf(u"wide"), u"wider");
+    EXPECT_EQ(film(), (Content{"wider 11-20", "both 18-20"}));
+
+    move(copyOf(u"both"), 39.0);
+    EXPECT_EQ(film(), (Content{"wider 11-20", "both 50-53"})) << "Most of it lies in the second.";
+}
+
+TEST_P(MemoSyncTest, AMemoThatLiesInSeveralStretchesIsWrittenOnce)
+{
+    preview({event("01:00:10:00", "01:00:16:00", "01:00:30:00", "01:00:36:00"),
+             event("01:00:50:00", "01:00:54:00", "01:00:36:00", "01:00:40:00")});
+
+    addCopy(u"wide", 31.0, 40.5);
+    EXPECT_EQ(film(), Content{"wide 11-16"});
+
+    rename(copyOf(u"wide"), u"wider");
+    EXPECT_EQ(film(), Content{"wider 11-16"});
+}
+
+TEST_P(MemoSyncTest, AMemoCannotMoveToAStretchThatItOnlyTouches)
+{
+    addMemo(u"loud", 12.0, 15.0);
+    preview({tenSeconds(), event("01:00:50:00", "01:01:00:00", "01:00:45:00", "01:00:55:00")});
+
+    move(copyOf(u"loud"), 42.0);
+
+    EXPECT_EQ(film(), Content{"loud 12-15"});
+}
+
+TEST_P(MemoSyncTest, OfTwoMemosWithTheSameIdEachFollowsItsOwnCopy)
+{
+    addMemo(u"one", 12.0);
+    addMemo(u"two", 15.0);
+    // A run that shows a stretch twice leaves two memos of one id.
+    createMarkerTracks();
+    host.edit(u"Ids", [&] { HostEvent(host.handle(memos), memoOf(u"two")).setUserId(idOf(memoOf(u"one"))); });
+    preview({tenSeconds()});
+    ASSERT_EQ(copies(), (Content{"one 32", "two 35"}));
+
+    move(copyOf(u"one"), 33.0);
+    EXPECT_EQ(film(), (Content{"one 13", "two 15"}));
+
+    move(copyOf(u"two"), 36.0);
+    EXPECT_EQ(film(), (Content{"one 13", "two 16"}));
+}
+
+TEST_P(MemoSyncTest, WhatWasDoneToOneCopyOutlivesWhatIsDoneToAnother)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"loud", 17.0, 18.0);
+    preview({tenSeconds(), event("01:00:10:00", "01:00:20:00", "01:01:00:00", "01:01:10:00")});
+
+    move(copyOf(u"cue", 0), 35.0);
+    rename(copyOf(u"cue", 1), u"gunshot");
+    EXPECT_EQ(film(), (Content{"gunshot 15", "loud 17-18"}));
+
+    rename(copyOf(u"loud", 0), u"louder");
+    resize(copyOf(u"loud"), 67.0, 69.0);
+    EXPECT_EQ(film(), (Content{"gunshot 15", "louder 17-19"}));
+}
+
+TEST_P(MemoSyncTest, WhatWasDoneToTheMemoItselfOutlivesWhatIsDoneToItsCopy)
+{
+    const auto cue = addMemo(u"cue", 12.0);
+    const auto loud = addMemo(u"loud", 17.0, 18.0);
+    preview({tenSeconds()});
+
+    host.edit(u"Move", [&] { requireOk(cue->setStart(nullptr, 0, PreviewedMemos::film(14.0))); });
+    rename(copyOf(u"cue"), u"gunshot");
+    EXPECT_EQ(film(), (Content{"gunshot 14", "loud 17-18"}));
+
+    rename(loud, u"louder");
+    resize(copyOf(u"loud"), 37.0, 39.0);
+    EXPECT_EQ(film(), (Content{"gunshot 14", "louder 17-19"}));
+}
+
+TEST_P(MemoSyncTest, AMemoCanTakeThePlaceOfAnother)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+
+    host.edit(u"Replace", [&] {
+        requireOk(host.transaction()->remove(host.root(), copyOf(u"cue").get()));
+        addCopy(u"splash", 33.0);
+    });
+
+    EXPECT_EQ(film(), Content{"splash 13"});
+}
+
+TEST_P(MemoSyncTest, WhereNothingIsKnownOfTheCopiesTheyAreCompared)
+{
+    const auto cue = addMemo(u"cue", 12.0);
+    addMemo(u"loud", 14.0, 16.0);
+    addMemo(u"splash", 18.0);
+    host.adapter.previewEvents().add(tenSeconds());
+    const auto copy = addCopy(u"gunshot", 33.0);
+    const auto other = addCopy(u"loud", 34.0, 37.0);
+    const Track handle = host.handle(memos);
+    createMarkerTracks();
+    HostEvent(handle, copy).setUserId(idOf(cue));
+    HostEvent(handle, other).setUserId(idOf(memoOf(u"loud")));
+    host.adapter.model().setPreviewActive(true);
+
+    host.edit(u"Edit", [&] { addCopy(u"stranger", 39.0); });
+    EXPECT_EQ(film(), (Content{"gunshot 13", "loud 14-17", "splash 18"}))
+        << "as many here as there: nothing was written";
+}
+
+TEST_P(MemoSyncTest, WhereNothingIsKnownOfTheCopiesTheirNumberTellsWhatWasRemovedOrWritten)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"splash", 18.0);
+    host.adapter.previewEvents().add(tenSeconds());
+    host.adapter.model().setPreviewActive(true);
+
+    addCopy(u"stranger", 39.0);
+
+    EXPECT_EQ(film(), Content()) << "There was one copy for two memos.";
+}
+
+TEST_P(MemoSyncTest, WhereNothingIsKnownOfTheCopiesAMemoThatWasDraggedOutStays)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"splash", 18.0);
+    preview({tenSeconds()});
+    host.adapter.model().setPreviewActive(false);
+    host.adapter.onProjectChanged();
+    host.adapter.model().setPreviewActive(true);
+
+    move(copyOf(u"cue"), 41.0);
+
+    EXPECT_EQ(film(), (Content{"cue 12", "splash 18"}));
+}
+
+TEST_P(MemoSyncTest, OfEventsThatOverlapEachIsFollowedWhereItIsSeen)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"covered", 17.0);
+    addMemo(u"half covered", 14.0, 19.0);
+    addMemo(u"over", 52.0);
+    preview({tenSeconds(), event("01:00:50:00", "01:01:00:00", "01:00:35:00", "01:00:45:00")});
+    ASSERT_EQ(copies(), (Content{"cue 32", "half covered 34-35", "over 37"}));
+
+    move(copyOf(u"cue"), 33.0);
+    EXPECT_EQ(film(), (Content{"cue 13", "half covered 14-19", "covered 17", "over 52"}));
+
+    move(copyOf(u"over"), 38.0);
+    EXPECT_EQ(film(), (Content{"cue 13", "half covered 14-19", "covered 17", "over 53"}));
+
+    addCopy(u"new", 36.0);
+    EXPECT_EQ(film(), (Content{"cue 13", "half covered 14-19", "covered 17", "new 51", "over 53"}));
+}
+
+TEST_P(MemoSyncTest, WhatAFasterEventDoesNotShowStays)
+{
+    addMemo(u"cue", 12.0);
+    addMemo(u"hidden", 18.0);
+    preview({event("01:00:10:00", "01:00:20:00", "01:00:30:00", "01:00:35:00"),
+             event("01:00:50:00", "01:01:00:00", "01:00:35:00", "01:00:45:00")});
+    ASSERT_EQ(copies(), Content{"cue 32"});
+
+    move(copyOf(u"cue"), 33.0);
+
+    EXPECT_EQ(film(), (Content{"cue 13", "hidden 18"}));
+}
+
+TEST_P(MemoSyncTest, BehindTheMaterialOfASlowerEventAMemoStandsAtItsEnd)
+{
+    preview({event("01:00:10:00", "01:00:20:00", "01:00:30:00", "01:00:50:00")});
+
+    addCopy(u"late", 45.0);
+
+    EXPECT_EQ(film(), Content{"late 20"});
+}
+
+TEST_P(MemoSyncTest, EventsThatWriteNothingArePassedOver)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    host.adapter.previewEvents().add(event("99:00:00:00", "01:00:20:00", "01:00:30:00", "01:00:40:00"));
+    host.adapter.previewEvents().add(event("01:00:20:00", "01:00:20:00", "01:00:30:00", "01:00:40:00"));
+    host.adapter.previewEvents().add(event("01:00:20:00", "01:00:10:00", "01:00:30:00", "01:00:40:00"));
+    host.adapter.previewEvents().add(event("01:00:10:00", "01:00:20:00", "01:00:40:00", "01:00:40:00"));
+
+    move(copyOf(u"cue"), 33.0);
+
+    EXPECT_EQ(film(), Content{"cue 13"});
+    EXPECT_EQ(followed, Result::Ok);
+}
+
+TEST_P(MemoSyncTest, ARefusalIsAFailure)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    const auto refusing = makeCounted<RefusingTransaction>();
+    hook->whenCalled = [&](const std::string& call) {
+        if (call == "edited")
+            followed = thrownBy([&] { host.adapter.onProjectEdited(*refusing); });
+    };
+
+    remove(copyOf(u"cue"));
+    EXPECT_EQ(followed, Result::HostCallFailed);
+    EXPECT_EQ(film(), Content{"cue 12"});
+
+    addCopy(u"splash", 35.0);
+    EXPECT_EQ(followed, Result::HostCallFailed);
+    EXPECT_EQ(film(), Content{"cue 12"});
+}
+
+/// Memos and previewed events in tens of seconds, at random; the events share neither sources nor destinations. The user
+/// edits copies of memos that are seen once, and takes them over the edges of their stretch and out of it, but not into
+/// another.
+class RandomPreview : public PreviewedMemos {
+public:
+    struct Memo {
+        std::string name;
+        int start;
+        int end; ///< that of a point is its start
+
+        bool operator==(const Memo&) const = default;
+        friend std::ostream& operator<<(std::ostream& out, const Memo& memo)
+        {
+            return out << memo.name << " " << memo.start << "-" << memo.end;
+        }
+    };
+    using Memos = std::map<std::int64_t, Memo>;
+
+    RandomPreview() : PreviewedMemos(*rc::gen::element(0.0, 3600.0))
+    {
+        const int memoCount = *rc::gen::inRange(0, 12);
+        for (int number = 0; number < memoCount; ++number) {
+            const int start = *rc::gen::inRange(0, Slots * SlotLength * 25);
+            add(start, *rc::gen::inRange(0, 300));
+        }
+        std::vector<int> sources(Slots);
+        std::iota(sources.begin(), sources.end(), 0);
+        for (std::size_t index = sources.size(); index > 1; --index)
+            std::swap(sources[index - 1], sources[*rc::gen::inRange<std::size_t>(0, index)]);
+        std::vector<std::shared_ptr<core::EventBase>> events;
+        for (int slot = 0; slot < Slots; ++slot) {
+            if (slot > 0 && *rc::gen::arbitrary<bool>())
+                continue;
+            const Shown shown{sources[static_cast<std::size_t>(slot)] * SlotLength * 25 + *rc::gen::inRange(0, 50),
+                              slot * SlotLength * 25 + *rc::gen::inRange(0, 50), *rc::gen::inRange(25, 200)};
+            const auto at = [](int frames) { return core::Timecode(90000 + frames); };
+            const auto previewed = std::make_shared<core::EventBase>();
+            previewed->setTimecodes(at(shown.source), at(shown.source + shown.length), at(shown.destination),
+                                    at(shown.destination + shown.length));
+            events.push_back(previewed);
+            stretches.push_back(shown);
+        }
+        preview(events);
+        expected = found();
+    }
+
+    void editSomething()
+    {
+        const Shown shown = *rc::gen::elementOf(stretches);
+        // The next stretch is further away than that.
+        const int from = shown.destination - Overhang;
+        const int until = shown.destination + shown.length + Overhang;
+        const int start = *rc::gen::inRange(from, until - 1);
+        const int end = *rc::gen::inRange(start + 1, until);
+
+        const std::vector<TrackHost::Node> copies = copiesWithin(from, until);
+        if (copies.empty() || *rc::gen::inRange(0, 4) == 0) {
+            const auto copy = add(start + DayFrames, *rc::gen::arbitrary<bool>() ? end - start : 0);
+            const Memo written = read(copy, Day);
+            if (shown.shows(written))
+                expected[idOf(copy)] = {written.name, shown.toSource(written.start), shown.toSource(written.end)};
+            return;
+        }
+        const TrackHost::Node copy = *rc::gen::elementOf(copies);
+        const std::int64_t id = idOf(copy);
+        // What lies in the film mostly elsewhere can be edited here, but not removed.
+        switch (*rc::gen::inRange(shown.holds(expected.at(id)) ? 0 : 1, 3)) {
+        case 0: {
+            const bool wasShown = shown.shows(read(copy, Day));
+            remove(copy);
+            if (wasShown)
+                expected.erase(id);
+            return;
+        }
+        case 1:
+            rename(copy, nextName().c_str());
+            break;
+        default:
+            if (copy->isType(TypeWord::Range))
+                resize(copy, start / 25.0, end / 25.0);
+            else
+                move(copy, start / 25.0);
+        }
+        const Memo edited = read(copy, Day);
+        if (!shown.shows(edited))
+            return;
+        // What the stretch doesn't show of a memo stays.
+        Memo& memo = expected.at(id);
+        const auto follow = [&shown](int& own, int inPreview) {
+            if (shown.clamped(own) != shown.toSource(inPreview))
+                own = shown.toSource(inPreview);
+        };
+        memo.name = edited.name;
+        follow(memo.start, edited.start);
+        follow(memo.end, edited.end);
+    }
+
+    /// The memos of the film by their ids.
+    Memos found()
+    {
+        Memos all;
+        for (const auto& memo : childrenOf(*memos)) {
+            if (memo->getStart(nullptr) < film(Day - 3600.0))
+                RC_ASSERT(all.emplace(idOf(memo), read(memo, 0.0)).second);
+        }
+        return all;
+    }
+
+    Memos expected;
+
+private:
+    struct Shown {
+        int source;
+        int destination;
+        int length;
+
+        bool shows(const Memo& copy) const
+        {
+            const int behind = destination + length;
+            return copy.start < behind && (copy.end > destination || copy.start >= destination);
+        }
+        bool holds(const Memo& memo) const { return memo.start >= source && memo.end <= source + length; }
+        int clamped(int sourceTime) const { return std::clamp(sourceTime, source, source + length); }
+        int toSource(int previewTime) const { return clamped(previewTime - destination + source); }
+    };
+
+    static constexpr int Slots = 6;
+    static constexpr int SlotLength = 12;
+    static constexpr int DayFrames = 86400 * 25;
+    static constexpr int Overhang = 24;
+
+    /// The copies that lie there whole, of memos that are in the film and that no other stretch shows.
+    std::vector<TrackHost::Node> copiesWithin(int from, int until)
+    {
+        std::vector<TrackHost::Node> copies;
+        std::map<std::int64_t, int> counts;
+        for (const auto& memo : childrenOf(*memos)) {
+            if (memo->getStart(nullptr) < film(Day - 3600.0))
+                continue;
+            const Memo copy = read(memo, Day);
+            ++counts[idOf(memo)];
+            if (copy.start >= from && copy.end <= until)
+                copies.push_back(memo);
+        }
+        std::erase_if(copies, [&](const TrackHost::Node& copy) {
+            return counts.at(idOf(copy)) > 1 || !expected.contains(idOf(copy));
+        });
+        return copies;
+    }
+
+    std::u16string nextName()
+    {
+        const std::string name = "memo " + std::to_string(++m_names);
+        return {name.begin(), name.end()};
+    }
+    TrackHost::Node add(int start, int length)
+    {
+        return length > 0 ? addMemo(nextName().c_str(), start / 25.0, (start + length) / 25.0)
+                          : addMemo(nextName().c_str(), start / 25.0);
+    }
+    Memo read(const TrackHost::Node& memo, double from)
+    {
+        const auto frames = [&](double time) { return static_cast<int>(std::lround((time - film(from)) * 25.0)); };
+        return {ConstString(memo->getName()).text8(), frames(memo->getStart(nullptr)), frames(memo->getEnd(nullptr))};
+    }
+
+    std::vector<Shown> stretches;
+    int m_names = 0;
+};
+
+RC_GTEST_PROP(MemoSyncLaw, AMemoFollowsItsCopyAndNoOtherChanges, ())
+{
+    RandomPreview preview;
+    for (int count = *rc::gen::inRange(1, 8); count > 0; --count) {
+        const auto before = preview.expected;
+        preview.editSomething();
+        RC_ASSERT(preview.found() == preview.expected);
+        if (*rc::gen::inRange(0, 4) == 0) {
+            preview.host.undo();
+            preview.expected = before;
+            RC_ASSERT(preview.found() == before);
+        }
+    }
+}
+
+} // namespace cadrel::host

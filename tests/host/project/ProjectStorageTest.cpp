@@ -1,0 +1,461 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/project/Project.h"
+
+#include "host/border/HostFailure.h"
+#include "host/undo/DataModelEditStep.h"
+#include "standin/project/AttributeList.h"
+#include "tests/core/TestProject.h"
+#include "tests/core/ThrownResult.h"
+#include "tests/core/edl/EventMaking.h"
+#include "tests/core/model/HexBytes.h"
+#include "tests/host/AlteredContext.h"
+#include "tests/host/track/FakeProject.h"
+#include "tests/host/track/TrackHost.h"
+#include "tests/util/TempFolder.h"
+#include "velmark/Attributes.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <filesystem>
+#include <set>
+#include <string>
+#include <vector>
+
+using namespace Velmark;
+using cadrel::core::serialize::ByteArchive;
+using cadrel::tests::archiveOf;
+using cadrel::tests::bytesOf;
+using cadrel::tests::makeEvent;
+using cadrel::tests::thrownBy;
+using cadrel::util::Result;
+
+namespace cadrel::host {
+
+using tests::AlteredContext;
+using tests::FakeProject;
+using tests::TrackHost;
+
+namespace {
+
+using Bytes = std::vector<std::uint8_t>;
+
+Bytes contentOf(const core::DataModel& model)
+{
+    return bytesOf(DataModelEditStep::snapshotOf(model));
+}
+
+/// A list of binary values that takes nothing and gives nothing.
+class StubbornList : public Implements<StubbornList, FObject, IAttributeData> {
+public:
+    static constexpr const char* ClassName = "StubbornList";
+
+    int32 setBinary(const char*, const void*, int32, bool) override { return ResultFalse; }
+    int32 getBinary(const char*, void*, int32) override { return ResultFalse; }
+    int32 getBinarySize(const char*) override { return 4; }
+};
+
+/// A project of a host that gives for attributes what it likes, and refuses to keep one.
+struct UnreliableProject : FakeProject {
+    UnreliableProject() : FakeProject(0.0) {}
+
+    /// What is stored under all keys.
+    FVariant value;
+    int32 readResult = ResultOk;
+    std::string refusedKey;
+    std::set<std::string> keptKeys;
+
+    int32 hasAttribute(const char*) override { return ResultOk; }
+    int32 getAttribute(const char*, FVariant& out) override
+    {
+        out = value;
+        return readResult;
+    }
+    int32 setAttribute(const char* key, const FVariant&, bool) override
+    {
+        if (key == refusedKey)
+            return ResultFalse;
+        keptKeys.insert(key);
+        return ResultOk;
+    }
+    int32 removeAttribute(const char* key) override { return keptKeys.erase(key) == 1 ? ResultOk : ResultFalse; }
+};
+
+class ProjectStorageTest : public testing::Test {
+protected:
+    void SetUp() override
+    {
+        core::DataModel& model = host.adapter.model();
+        model.oldEdl().add(makeEvent("A", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00", 1));
+        model.newEdl().add(makeEvent("A", "00:10:02:00", "00:10:10:00", "01:00:00:00", "01:00:08:00", 1));
+        model.changeEdl().add(makeEvent("A", "01:00:02:00", "01:00:10:00", "01:00:00:00", "01:00:08:00", 1));
+        model.setProperty(core::PropertyKey::PreviewOffset, core::Variant(86400.0));
+        model.settings().setHealMode(core::HealMode::GapsWithInserts);
+        model.videoList().add(
+            core::VideoList::Entry("/video/reel.mov", core::Timecode("01:00:00:00"), core::Timecode("00:20:00:00")),
+            false);
+    }
+
+    FVariant stored(const char* key)
+    {
+        FVariant value;
+        host.root()->getAttribute(key, value);
+        return value;
+    }
+    Bytes storedBlock()
+    {
+        const FVariant storage = stored(AttributeKey::Storage);
+        const auto* const list = dynamic_cast<standin::AttributeList*>(storage.asObject());
+        return list ? list->values().at(AttributeKey::StorageData) : Bytes();
+    }
+
+    void store(const Bytes& block) { store(block, archiveOf(block).crc32()); }
+    void store(const Bytes& block, std::int64_t checksum)
+    {
+        const auto list = makeCounted<standin::AttributeList>();
+        list->set(AttributeKey::StorageData, block);
+        requireOk(host.root()->setAttribute(AttributeKey::Storage, FVariant::object(query<IAttributeData>(list).get()),
+                                            true));
+        requireOk(host.root()->setAttribute(AttributeKey::StorageChecksum, FVariant::integer(checksum), true));
+    }
+
+    /// What a project that the host opens throws at loading, with its model empty in any case.
+    Result::Type loadFailure()
+    {
+        Project opened(host.context(), host.document(), nullptr);
+        const Bytes fresh = contentOf(opened.model());
+        const Result::Type failure = thrownBy([&] { opened.load(); });
+        EXPECT_EQ(contentOf(opened.model()), fresh);
+        return failure;
+    }
+
+    /// Stands for the project that is active meanwhile.
+    cadrel::tests::TestProject timecodes;
+    TrackHost host{0.0};
+};
+
+} // namespace
+
+TEST_F(ProjectStorageTest, AProjectWithoutStoredDataStartsEmpty)
+{
+    EXPECT_EQ(loadFailure(), Result::Ok);
+}
+
+TEST_F(ProjectStorageTest, StoresTheModelAndItsChecksumUnderTheirKeys)
+{
+    host.adapter.save();
+
+    EXPECT_EQ(storedBlock(), contentOf(host.adapter.model()));
+    EXPECT_EQ(stored(AttributeKey::StorageChecksum).asInteger(), archiveOf(storedBlock()).crc32());
+    const auto& attributes = host.project.attributes();
+    EXPECT_TRUE(attributes.at(AttributeKey::Storage).isPersistent);
+    EXPECT_TRUE(attributes.at(AttributeKey::StorageChecksum).isPersistent);
+}
+
+TEST_F(ProjectStorageTest, ReadsBackWhatItHasStored)
+{
+    host.adapter.save();
+
+    Project opened(host.context(), host.document(), nullptr);
+    opened.load();
+
+    EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
+    EXPECT_EQ(opened.previewOffset(), 86400.0);
+}
+
+TEST_F(ProjectStorageTest, WhatItHasStoredIsInTheProjectFile)
+{
+    const cadrel::tests::TempFolder folder;
+    const std::filesystem::path file = folder / "reel.stage";
+    host.adapter.save();
+    host.application.saveProject(host.project, file);
+
+    standin::Project& reopened = host.application.openProject(file);
+    Project opened(host.context(), &reopened, nullptr);
+    opened.load();
+
+    EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
+}
+
+TEST_F(ProjectStorageTest, ASaveReplacesWhatWasStored)
+{
+    host.adapter.save();
+    host.adapter.model().changeEdl().clear();
+
+    host.adapter.save();
+
+    EXPECT_EQ(storedBlock(), contentOf(host.adapter.model()));
+    EXPECT_EQ(stored(AttributeKey::StorageChecksum).asInteger(), archiveOf(storedBlock()).crc32());
+}
+
+TEST_F(ProjectStorageTest, EveryFlippedBitOfTheBlockIsFound)
+{
+    Bytes block = contentOf(host.adapter.model());
+    const std::uint32_t checksum = archiveOf(block).crc32();
+    for (std::size_t bit = 0; bit < 8 * block.size(); ++bit) {
+        const auto mask = static_cast<std::uint8_t>(1U << (bit % 8));
+        block[bit / 8] ^= mask;
+        store(block, checksum);
+        ASSERT_EQ(loadFailure(), Result::ChecksumMismatch) << "bit " << bit;
+        block[bit / 8] ^= mask;
+    }
+}
+
+TEST_F(ProjectStorageTest, EveryFlippedBitOfTheChecksumIsFound)
+{
+    const Bytes block = contentOf(host.adapter.model());
+    const std::uint32_t checksum = archiveOf(block).crc32();
+    for (int bit = 0; bit < 32; ++bit) {
+        store(block, checksum ^ (std::uint32_t{1} << bit));
+        ASSERT_EQ(loadFailure(), Result::ChecksumMismatch) << "bit " << bit;
+    }
+}
+
+TEST_F(ProjectStorageTest, OnlyTheLow32BitsOfTheChecksumCount)
+{
+    const Bytes block = contentOf(host.adapter.model());
+    for (const std::int64_t above : {std::int64_t{1} << 32, std::int64_t{-1} << 32}) {
+        store(block, above | archiveOf(block).crc32());
+
+        Project opened(host.context(), host.document(), nullptr);
+        opened.load();
+
+        EXPECT_EQ(contentOf(opened.model()), block);
+    }
+}
+
+TEST_F(ProjectStorageTest, ASaveAfterAFailedLoadReplacesWhatWasStored)
+{
+    store(contentOf(host.adapter.model()), 0);
+    Project opened(host.context(), host.document(), nullptr);
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::ChecksumMismatch);
+
+    opened.model().newEdl().add(makeEvent("B", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00", 1));
+    opened.save();
+
+    EXPECT_EQ(storedBlock(), contentOf(opened.model()));
+    EXPECT_EQ(stored(AttributeKey::StorageChecksum).asInteger(), archiveOf(storedBlock()).crc32());
+}
+
+TEST_F(ProjectStorageTest, ANewerVersionIsRefused)
+{
+    store(bytesOf("02 00 00 00"));
+
+    EXPECT_EQ(loadFailure(), Result::NewerVersion);
+}
+
+TEST_F(ProjectStorageTest, ANewerVersionWithinIsRefused)
+{
+    // The model in its version, the old EDL in one to come.
+    store(bytesOf("01 00 00 00  01 00 00 00  00 00 00 00"));
+
+    EXPECT_EQ(loadFailure(), Result::NewerVersion);
+}
+
+TEST_F(ProjectStorageTest, AnOlderVersionIsRead)
+{
+    Bytes block = contentOf(host.adapter.model());
+    // The list of videos is what version 0 has not got: version and count of the list, and in the one entry its own version,
+    // 4 + 15 bytes of path and two timecodes of 9 bytes each.
+    block.resize(block.size() - (4 + 4 + 4 + 4 + 15 + 9 + 9));
+    block[0] = 0;
+    store(block);
+
+    Project opened(host.context(), host.document(), nullptr);
+    opened.load();
+
+    EXPECT_EQ(opened.model().changeEdl().size(), 1U);
+    EXPECT_EQ(opened.model().settings().healMode(), core::HealMode::GapsWithInserts);
+    EXPECT_TRUE(opened.model().videoList().isEmpty());
+}
+
+TEST_F(ProjectStorageTest, AnOlderVersionThatBreaksOffIsUnknown)
+{
+    store(bytesOf("00 00 00 00  00 00 00 00"));
+
+    EXPECT_EQ(loadFailure(), Result::UnknownVersion);
+}
+
+TEST_F(ProjectStorageTest, ABlockThatBreaksOffGivesAnEmptyModel)
+{
+    const Bytes block = contentOf(host.adapter.model());
+    for (std::size_t size = 0; size < block.size(); ++size) {
+        store(Bytes(block.begin(), block.begin() + static_cast<std::ptrdiff_t>(size)));
+        ASSERT_EQ(loadFailure(), Result::EndOfData) << "after " << size << " bytes";
+    }
+}
+
+TEST_F(ProjectStorageTest, AChecksumThatIsMissingCannotBeRead)
+{
+    store(contentOf(host.adapter.model()));
+    host.root()->removeAttribute(AttributeKey::StorageChecksum);
+
+    EXPECT_EQ(loadFailure(), Result::HostCallFailed);
+}
+
+TEST_F(ProjectStorageTest, AChecksumThatIsNoNumberCountsAsZero)
+{
+    store(contentOf(host.adapter.model()));
+    host.root()->setAttribute(AttributeKey::StorageChecksum, FVariant::string("12"), true);
+    EXPECT_EQ(loadFailure(), Result::ChecksumMismatch);
+
+    // The checksum of no bytes is zero.
+    store({});
+    host.root()->setAttribute(AttributeKey::StorageChecksum, FVariant::string("12"), true);
+    EXPECT_EQ(loadFailure(), Result::EndOfData);
+}
+
+TEST_F(ProjectStorageTest, WhatIsStoredHasToBeAList)
+{
+    for (const FVariant& value : {FVariant(), FVariant::integer(1), FVariant::string("CaDrData"),
+                                  FVariant::object(nullptr), FVariant::object(host.document())}) {
+        const auto project = makeCounted<UnreliableProject>();
+        project->value = value;
+        EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostObjectMissing);
+    }
+}
+
+TEST_F(ProjectStorageTest, TheListHasToHoldTheBlock)
+{
+    const auto list = makeCounted<standin::AttributeList>();
+    host.root()->setAttribute(AttributeKey::Storage, FVariant::object(query<IAttributeData>(list).get()), true);
+    host.root()->setAttribute(AttributeKey::StorageChecksum, FVariant::integer(0), true);
+
+    EXPECT_EQ(loadFailure(), Result::HostCallFailed);
+}
+
+TEST_F(ProjectStorageTest, FailsWhereTheHostGivesNothing)
+{
+    const auto project = makeCounted<UnreliableProject>();
+    project->value = FVariant::object(query<IAttributeData>(makeCounted<StubbornList>()).get());
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostCallFailed);
+
+    project->readResult = ResultFalse;
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostCallFailed);
+
+    project->isNode = false;
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostObjectMissing);
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).save(); }), Result::HostObjectMissing);
+}
+
+TEST_F(ProjectStorageTest, ASaveThatFailsLeavesNothingStored)
+{
+    host.adapter.save();
+    AlteredContext altered(host.context());
+    Project project(&altered, host.document(), nullptr);
+
+    altered.hide(IAttributeData::iid);
+    EXPECT_EQ(thrownBy([&] { project.save(); }), Result::HostObjectMissing);
+    EXPECT_NE(host.root()->hasAttribute(AttributeKey::Storage), ResultOk);
+    EXPECT_NE(host.root()->hasAttribute(AttributeKey::StorageChecksum), ResultOk);
+
+    EXPECT_EQ(loadFailure(), Result::Ok) << "as in a project that never was stored";
+}
+
+TEST_F(ProjectStorageTest, ASaveFailsWhereTheHostTakesNothing)
+{
+    AlteredContext altered(host.context());
+    altered.replace(IAttributeData::iid, makeCounted<StubbornList>());
+    EXPECT_EQ(thrownBy([&] { Project(&altered, host.document(), nullptr).save(); }), Result::HostCallFailed);
+
+    const auto project = makeCounted<UnreliableProject>();
+    project->refusedKey = AttributeKey::Storage;
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).save(); }), Result::HostCallFailed);
+    EXPECT_TRUE(project->keptKeys.empty());
+
+    project->refusedKey = AttributeKey::StorageChecksum;
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).save(); }), Result::HostCallFailed);
+    EXPECT_TRUE(project->keptKeys.empty());
+
+    project->refusedKey = "";
+    Project(host.context(), project.get(), nullptr).save();
+    EXPECT_EQ(project->keptKeys, (std::set<std::string>{AttributeKey::Storage, AttributeKey::StorageChecksum}));
+}
+
+TEST_F(ProjectStorageTest, ReadsTheTimecodesUnderTheRateOfItsOwnProject)
+{
+    // The 28th frame of a second is one of 30 frames, and none of 25.
+    core::DataModel& model = host.adapter.model();
+    timecodes.framerate = core::Framerate(30, 0);
+    model.newEdl().clear();
+    model.newEdl().add(makeEvent("B", "00:10:00:28", "00:10:10:28", "01:00:00:28", "01:00:10:28", 1));
+    host.adapter.save();
+    host.project.setFrameRate({30.0, 0});
+    timecodes.framerate = core::Framerate(25, 0);
+
+    Project opened(host.context(), host.document(), nullptr);
+    opened.load();
+
+    EXPECT_TRUE(opened.model().newEdl().at(0).isValid());
+    EXPECT_EQ(core::Timecode::framerateProvider(), &timecodes);
+}
+
+TEST_F(ProjectStorageTest, PutsTheRateBackAfterAFailure)
+{
+    store(bytesOf("01 00 00 00"));
+
+    EXPECT_EQ(loadFailure(), Result::EndOfData);
+
+    EXPECT_EQ(core::Timecode::framerateProvider(), &timecodes);
+}
+
+TEST_F(ProjectStorageTest, FindsTheTracksThatItHeldLocked)
+{
+    const auto held = host.addTrack(TypeWord::Audio, u"FX");
+    const auto lockedByTheUser = host.addTrack(TypeWord::Audio, u"Music");
+    host.handle(held).setLock(true);
+    requireOk(query<ITrackNode>(lockedByTheUser)->setFlag(TrackFlag::Lock, true));
+    host.adapter.model().setPreviewActive(true);
+    host.adapter.save();
+
+    Project opened(host.context(), host.document(), nullptr);
+    opened.load();
+    EXPECT_TRUE(host.handle(held).hostLocked()) << "The preview goes on.";
+    opened.setTracksLocked(false);
+
+    EXPECT_FALSE(host.handle(held).hostLocked());
+    EXPECT_TRUE(host.handle(lockedByTheUser).hostLocked());
+}
+
+TEST_F(ProjectStorageTest, UnlocksWhatItHeldForAPreviewThatIsGone)
+{
+    const auto held = host.addTrack(TypeWord::Audio, u"FX");
+    const auto markers = host.addTrack(TypeWord::Marker, u"Insert");
+    const auto lockedByTheUser = host.addTrack(TypeWord::Audio, u"Music");
+    requireOk(query<ITrackNode>(lockedByTheUser)->setFlag(TrackFlag::Lock, true));
+    host.adapter.model().setPreviewActive(true);
+    const Bytes block = contentOf(host.adapter.model());
+    const auto expectUnlocked = [&] {
+        for (const auto& track : {held, markers}) {
+            EXPECT_FALSE(host.handle(track).hostLocked());
+            EXPECT_FALSE(host.handle(track).hasLockState());
+        }
+        EXPECT_TRUE(host.handle(lockedByTheUser).hostLocked());
+    };
+    const auto lock = [&] {
+        for (const auto& track : {held, markers})
+            host.handle(track).setLock(true);
+    };
+
+    lock();
+    EXPECT_EQ(loadFailure(), Result::Ok) << "Nothing is stored.";
+    expectUnlocked();
+
+    lock();
+    store(block, archiveOf(block).crc32() ^ 1U);
+    EXPECT_EQ(loadFailure(), Result::ChecksumMismatch);
+    expectUnlocked();
+}
+
+TEST_F(ProjectStorageTest, GivesAnEmptyModelWhereTheTracksCannotBeRead)
+{
+    const auto project = FakeProject::withoutUsableTrack();
+    Project opened(host.context(), project.get(), nullptr);
+
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::HostObjectMissing);
+
+    EXPECT_EQ(contentOf(opened.model()), contentOf(Project(host.context(), project.get(), nullptr).model()));
+}
+
+} // namespace cadrel::host

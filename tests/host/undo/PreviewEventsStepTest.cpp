@@ -1,0 +1,44 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/undo/PreviewEventsStep.h"
+
+#include "core/edl/EventBase.h"
+#include "velmark/Counted.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+
+namespace cadrel::host::tests {
+
+using Events = PreviewEventsStep::Events;
+
+TEST(PreviewEventsStep, ChangesTheListForTheOtherOneByTurns)
+{
+    const auto first = std::make_shared<core::EventBase>();
+    const auto second = std::make_shared<core::EventBase>();
+    core::EventList list;
+    list.add(second);
+    const auto step = Velmark::makeCounted<PreviewEventsStep>(list, Events{first, first});
+
+    for (int round = 0; round < 2; ++round) {
+        EXPECT_EQ(step->undo(), Velmark::ResultOk);
+        EXPECT_EQ(list.events(), (Events{first, first}));
+        EXPECT_EQ(step->redo(), Velmark::ResultOk);
+        EXPECT_EQ(list.events(), Events{second});
+    }
+}
+
+TEST(PreviewEventsStep, IsPartOfItsEntryAndNothingMore)
+{
+    core::EventList list;
+    const auto step = Velmark::makeCounted<PreviewEventsStep>(list, Events{std::make_shared<core::EventBase>()});
+
+    EXPECT_EQ(step->execute(), Velmark::ResultOk);
+
+    EXPECT_TRUE(list.isEmpty());
+    EXPECT_EQ(step->getDescription(), nullptr);
+    EXPECT_TRUE(step->isA("PreviewEventsStep", false));
+}
+
+} // namespace cadrel::host::tests

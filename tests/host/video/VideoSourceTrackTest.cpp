@@ -1,0 +1,243 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/video/VideoSourceTrack.h"
+
+#include "core/model/VideoList.h"
+#include "host/border/HostFailure.h"
+#include "host/video/PoolVideoSource.h"
+#include "host/video/VideoTrackHandler.h"
+#include "tests/host/AlteredContext.h"
+#include "tests/host/video/VideoHost.h"
+#include "velmark/ClassId.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+using namespace Velmark;
+
+namespace cadrel::host {
+
+using core::Timecode;
+using core::VideoList;
+using tests::VideoHost;
+using util::Result;
+using Mode = gui::VideoTrackHandlerBase::Mode;
+
+namespace {
+
+/// What stands on a track: from when to when in seconds of the host, and which video.
+struct Written {
+    double start = 0.0;
+    double end = 0.0;
+    const IMediaClip* clip = nullptr;
+
+    bool operator==(const Written&) const = default;
+};
+
+/// A list of two videos, from ten seconds after the beginning of the project's clock on and right behind the first. With a
+/// clock that begins at 0 and with one that begins at 01:00:00:00.
+class VideoSourceTrackTest : public testing::TestWithParam<double> {
+protected:
+    VideoSourceTrackTest()
+    {
+        list.add(VideoList::Entry("/picture/reel3_v12.mov", Timecode(host.clock(10.0)), Timecode(0, 0, 4, 0)), false);
+        list.add(VideoList::Entry("/picture/reel4_v12.mov", Timecode(host.clock(14.0)), Timecode(0, 0, 2, 0)), false);
+        source.setMediaPool(&host.adapter.mediaPool());
+        source.setVideoList(&list);
+        handler.rebuild(&host.adapter);
+    }
+    ~VideoSourceTrackTest() override { source.setVideoList(nullptr); }
+
+    void write()
+    {
+        host.edit(u"Write", [&] { writer.writeVideoEvents(*host.transaction()); });
+    }
+    std::vector<Written> written(const VideoHost::Node& track)
+    {
+        std::vector<Written> events;
+        for (const auto& child : standin::tests::childrenOf(*track))
+            events.push_back(
+                {child->getStart(nullptr), child->getEnd(nullptr), query<IClipEvent>(child.get())->getClip()});
+        return events;
+    }
+
+    VideoHost host{GetParam()};
+    const VideoHost::Node oldTrack = host.addVideoTrack(u"old", TrackRole::OldVideo);
+    const VideoHost::Node newTrack = host.addVideoTrack(u"new", TrackRole::NewVideo);
+    standin::MediaClip& reel3 = host.addVideo(u"/picture/reel3_v12.mov", 4.0);
+    standin::MediaClip& reel4 = host.addVideo(u"/picture/reel4_v12.mov", 2.0);
+    VideoList list;
+    PoolVideoSource source;
+    VideoTrackHandler handler;
+    VideoSourceTrack writer{host.context(), source, handler, Mode::New};
+};
+
+INSTANTIATE_TEST_SUITE_P(Origins, VideoSourceTrackTest, testing::Values(0.0, 3600.0));
+
+} // namespace
+
+TEST_P(VideoSourceTrackTest, WritesEachVideoOfTheListWhereItStands)
+{
+    write();
+
+    EXPECT_EQ(written(newTrack), (std::vector<Written>{{10.0, 14.0, &reel3}, {14.0, 16.0, &reel4}}));
+    EXPECT_TRUE(written(oldTrack).empty());
+}
+
+TEST_P(VideoSourceTrackTest, WritesThemLaterByItsOffset)
+{
+    writer.setOffset(86400.0);
+
+    write();
+
+    EXPECT_EQ(written(newTrack), (std::vector<Written>{{86410.0, 86414.0, &reel3}, {86414.0, 86416.0, &reel4}}));
+}
+
+TEST_P(VideoSourceTrackTest, ReplacesWhatStoodOnTheTrack)
+{
+    host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
+    host.addPart(newTrack, u"part", 100.0, 200.0);
+    host.addVideoEvent(oldTrack, reel4, 0.0, 2.0);
+    const std::string before = host.dump();
+
+    write();
+    EXPECT_EQ(written(newTrack), (std::vector<Written>{{10.0, 14.0, &reel3}, {14.0, 16.0, &reel4}}));
+    EXPECT_EQ(written(oldTrack), (std::vector<Written>{{0.0, 2.0, &reel4}}));
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.dump(), before);
+}
+
+TEST_P(VideoSourceTrackTest, WritesTheSameWhenItWritesAgain)
+{
+    write();
+    write();
+
+    EXPECT_EQ(written(newTrack), (std::vector<Written>{{10.0, 14.0, &reel3}, {14.0, 16.0, &reel4}}));
+}
+
+TEST_P(VideoSourceTrackTest, LeavesTheTrackAloneWithoutVideos)
+{
+    host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
+    const std::string before = host.dump();
+
+    list.clear();
+    write();
+    EXPECT_EQ(host.dump(), before);
+
+    source.setVideoList(nullptr);
+    write();
+    EXPECT_EQ(host.dump(), before);
+}
+
+TEST_P(VideoSourceTrackTest, WritesNothingWithoutATrack)
+{
+    host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), newTrack.get())); });
+    const std::string before = host.dump();
+
+    write();
+    EXPECT_EQ(host.dump(), before);
+
+    handler.rebuild(nullptr);
+    write();
+    EXPECT_EQ(host.dump(), before);
+}
+
+TEST_P(VideoSourceTrackTest, EmptiesATrackThatIsTurnedOffAndDoesNotFillIt)
+{
+    host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
+    handler.setMode(1, Mode::NewOff);
+
+    write();
+
+    EXPECT_TRUE(written(newTrack).empty());
+}
+
+TEST_P(VideoSourceTrackTest, NeverWritesOnTheTrackOfTheOldPicture)
+{
+    host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), newTrack.get())); });
+    const auto second = host.addVideoTrack(u"second", TrackRole::OldVideo);
+    host.addVideoEvent(oldTrack, reel4, 0.0, 2.0);
+    host.addVideoEvent(second, reel4, 0.0, 2.0);
+    handler.rebuild(&host.adapter);
+    const std::string before = host.dump();
+
+    write();
+
+    EXPECT_EQ(host.dump(), before);
+}
+
+TEST_P(VideoSourceTrackTest, AVideoThatIsNotInThePoolIsAnEventWithoutAClip)
+{
+    list.add(VideoList::Entry("/picture/reel5.mov", Timecode(host.clock(20.0)), Timecode(0, 0, 1, 0)), false);
+
+    write();
+
+    EXPECT_EQ(written(newTrack),
+              (std::vector<Written>{{10.0, 14.0, &reel3}, {14.0, 16.0, &reel4}, {20.0, 21.0, nullptr}}));
+}
+
+TEST_P(VideoSourceTrackTest, WithoutAPoolTheTrackIsEmptied)
+{
+    host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
+    source.setMediaPool(nullptr);
+
+    write();
+
+    EXPECT_TRUE(written(newTrack).empty());
+}
+
+TEST_P(VideoSourceTrackTest, WritesOnTheTrackThatHasThePictureNow)
+{
+    handler.setMode(0, Mode::New);
+
+    write();
+
+    EXPECT_EQ(written(oldTrack), (std::vector<Written>{{10.0, 14.0, &reel3}, {14.0, 16.0, &reel4}}));
+    EXPECT_TRUE(written(newTrack).empty());
+}
+
+TEST_P(VideoSourceTrackTest, ReportsWhatTheHostRefuses)
+{
+    // No transaction is open.
+    EXPECT_EQ(resultOf([&] { writer.writeVideoEvents(*host.transaction()); }), Result::HostCallFailed);
+    EXPECT_TRUE(written(newTrack).empty());
+}
+
+TEST_P(VideoSourceTrackTest, ReportsAVideoThatWouldStandBeforeTheBeginningOfTheProject)
+{
+    writer.setOffset(-11.0);
+
+    host.edit(u"Write", [&] {
+        EXPECT_EQ(resultOf([&] { writer.writeVideoEvents(*host.transaction()); }), Result::HostCallFailed);
+    });
+}
+
+TEST_P(VideoSourceTrackTest, MissesEventsWhereTheHostMakesNone)
+{
+    tests::AlteredContext context(host.context());
+    context.hide(ClassId::ClipEvent);
+    VideoSourceTrack another(&context, source, handler, Mode::New);
+
+    host.edit(u"Write", [&] {
+        EXPECT_EQ(resultOf([&] { another.writeVideoEvents(*host.transaction()); }), Result::HostObjectMissing);
+    });
+}
+
+TEST_P(VideoSourceTrackTest, LeavesItsHandlerWhenItGoes)
+{
+    {
+        const VideoSourceTrack another(host.context(), source, handler, Mode::New);
+    }
+
+    // Nobody is there to be told; under the sanitizer a call would show.
+    handler.rebuild(&host.adapter);
+
+    EXPECT_TRUE(handler.isAvailable(1));
+}
+
+} // namespace cadrel::host
