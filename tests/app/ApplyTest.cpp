@@ -3,6 +3,7 @@
 #include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/SoundProject.h"
+#include "tests/support/TreePaths.h"
 
 #include <algorithm>
 #include <array>
@@ -538,7 +539,7 @@ TEST(Apply, EachKindOfMarkerCanBeSwitchedOff)
     EXPECT_EQ(overlapsWith("--overlap-markers"), 1U);
     EXPECT_EQ(overlapsWith("--no-overlap-markers"), 0U);
 
-    const std::string folder = CADREL_EXAMPLES "/reel3/";
+    const std::string folder = treePath("examples/reel3/");
     const auto kindsWith = [&](const std::string& option) {
         const Outcome outcome =
             runCadrel({"apply", folder + "reel3.stage", "--old", folder + "reel3_v07.edl", "--new",
@@ -893,7 +894,7 @@ TEST(Apply, AnInterruptionTakesTheRunBackAndLeavesTheFilesAsTheyWere)
 
 TEST(Apply, TheSoundOfAReelGoesOverToItsNewCut)
 {
-    const std::string folder = CADREL_EXAMPLES "/reel3/";
+    const std::string folder = treePath("examples/reel3/");
 
     const Outcome outcome = runCadrel({"apply", folder + "reel3.stage", "--old", folder + "reel3_v07.edl", "--new",
                                        folder + "reel3_v12.edl", "--vfx", "VFX_****_v,_comp", "--json", "-"});

@@ -2,6 +2,7 @@
 
 #include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
+#include "tests/support/TreePaths.h"
 
 #include <array>
 #include <cstdio>
@@ -396,7 +397,7 @@ TEST(Generate, WarningsNameTheFileAndStrictStops)
 TEST(Generate, TheExampleReelGivesAChangeEdlWhoseEventsKeepTheirLength)
 {
     const TempFolder folder;
-    const std::string examples = CADREL_EXAMPLES;
+    const std::string examples = treePath("examples");
 
     const Outcome outcome =
         runCadrel({"generate", "--old", examples + "/reel3/reel3_v07.edl", "--new", examples + "/reel3/reel3_v12.edl",

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/ProgramRun.h"
+#include "tests/support/TreePaths.h"
 
 #include <algorithm>
 #include <array>
@@ -102,7 +103,7 @@ Outcome runOnTerminal(const std::vector<std::string>& arguments, const std::stri
     outputs.open(STDERR_FILENO, ptsname(terminal));
     std::vector<std::string> variables{"TERM=xterm", environment};
 
-    const pid_t child = start(commandLine(CADREL_PROGRAM, arguments), outputs, pointersTo(variables).data());
+    const pid_t child = start(commandLine(programPath("cadrel"), arguments), outputs, pointersTo(variables).data());
     std::string shown;
     std::array<char, 4096> part{};
     // The reading fails once the program has closed its side.
@@ -126,7 +127,7 @@ bool isRoot()
 
 Outcome runCadrel(const std::vector<std::string>& arguments, const std::string& outPath)
 {
-    return run(commandLine(CADREL_PROGRAM, arguments), outPath);
+    return run(commandLine(programPath("cadrel"), arguments), outPath);
 }
 
 Outcome runProgram(const std::string& program, const std::vector<std::string>& arguments)
@@ -141,7 +142,7 @@ Outcome runCadrelUnprivileged(const std::vector<std::string>& arguments)
     // The build may stand in a folder that only root may enter.
     const TempFolder folder;
     const std::string program = folder / "cadrel";
-    std::filesystem::copy_file(CADREL_PROGRAM, program);
+    std::filesystem::copy_file(programPath("cadrel"), program);
     giveToUnprivileged(folder.path());
     const std::string id = std::to_string(Nobody);
     std::vector<std::string> words{"setpriv", "--reuid=" + id, "--regid=" + id, "--clear-groups", program};
@@ -160,7 +161,7 @@ Outcome runCadrelInterrupted(const std::vector<std::string>& arguments, const Te
     outputs.open(STDOUT_FILENO, "/dev/null");
     outputs.open(STDERR_FILENO, "/dev/null");
 
-    const pid_t child = start(commandLine(CADREL_PROGRAM, arguments), outputs, environ);
+    const pid_t child = start(commandLine(programPath("cadrel"), arguments), outputs, environ);
     const auto hasEnded = [child] {
         siginfo_t state{};
         return waitid(P_PID, static_cast<id_t>(child), &state, WEXITED | WNOHANG | WNOWAIT) == 0 && state.si_pid != 0;

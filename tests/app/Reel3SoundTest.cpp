@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/ProgramRun.h"
+#include "tests/support/TreePaths.h"
 
 #include <algorithm>
 #include <cmath>
@@ -15,7 +16,7 @@ namespace {
 using namespace cadrel::tests;
 using nlohmann::json;
 
-const std::string Reel3 = CADREL_EXAMPLES "/reel3/";
+const std::string Reel3 = treePath("examples/reel3/");
 
 json jsonOf(std::vector<std::string> arguments)
 {
@@ -87,7 +88,7 @@ TEST_F(Reel3Sound, IsMadeAgainByteForByte)
     const TempFolder folder;
     const std::string file = folder / "reel3.stage";
 
-    const Outcome outcome = runProgram(CADREL_MAKE_REEL3, {Reel3 + "reel3_v07.edl", file});
+    const Outcome outcome = runProgram(programPath("make_reel3"), {Reel3 + "reel3_v07.edl", file});
 
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     // Not EXPECT_EQ, which would print both.
@@ -218,11 +219,11 @@ TEST_F(Reel3Sound, CanBeReadInATextEditor)
 TEST_F(Reel3Sound, TheProgramThatMakesItTellsWhatItCantRead)
 {
     const TempFolder folder;
-    const Outcome outcome = runProgram(CADREL_MAKE_REEL3, {folder / "none.edl", folder / "reel3.stage"});
+    const Outcome outcome = runProgram(programPath("make_reel3"), {folder / "none.edl", folder / "reel3.stage"});
 
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.err, "make_reel3: " + (folder / "none.edl").string() + ": can't be read\n");
-    EXPECT_EQ(runProgram(CADREL_MAKE_REEL3, {}).status, 2);
+    EXPECT_EQ(runProgram(programPath("make_reel3"), {}).status, 2);
     EXPECT_TRUE(folder.names().empty());
 }
 

@@ -4,6 +4,7 @@
 
 #include "standin/file/ProjectKeys.h"
 #include "tests/standin/ProjectText.h"
+#include "tests/support/TreePaths.h"
 #include "tests/util/TempFolder.h"
 
 #include <gtest/gtest.h>
@@ -16,7 +17,7 @@ namespace {
 
 std::string page()
 {
-    return cadrel::tests::contentOf(CADREL_PROJECT_FILE_PAGE);
+    return cadrel::tests::contentOf(cadrel::tests::treePath("docs/project-file.md"));
 }
 
 /// What stands between the first line of that kind and the end of the block.

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "tests/support/TreePaths.h"
+
 #include <gtest/gtest.h>
 
 #include <filesystem>
@@ -44,7 +46,7 @@ void append(std::string& list, const std::string& item)
 Interfaces declaredInterfaces()
 {
     Interfaces interfaces;
-    for (const auto& entry : std::filesystem::directory_iterator(CADREL_VELMARK)) {
+    for (const auto& entry : std::filesystem::directory_iterator(cadrel::tests::treePath("src/velmark"))) {
         if (entry.path().extension() != ".h")
             continue;
         const std::string header = contentOf(entry.path());
@@ -64,7 +66,7 @@ Interfaces declaredInterfaces()
 Interfaces listedInterfaces()
 {
     Interfaces interfaces;
-    const std::string page = contentOf(CADREL_HOST_INTERFACES_PAGE);
+    const std::string page = contentOf(cadrel::tests::treePath("docs/host-interfaces.md"));
     forEachMatch(page, R"(\n\| `(\w+)` \| (\w{32}|none) \| ([^|]*) \|)", [&](const std::smatch& row) {
         Interface interface {
             row[2], {}
