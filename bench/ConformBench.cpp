@@ -10,7 +10,7 @@
 #include "core/detect/OverlapDetectAlgorithm.h"
 #include "core/detect/RemainsDetectAlgorithm.h"
 #include "core/detect/TransitionDetectAlgorithm.h"
-#include "tests/core/conform/ConformFilm.h"
+#include "tests/support/core/ConformFilm.h"
 
 #include <benchmark/benchmark.h>
 

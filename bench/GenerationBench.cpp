@@ -5,8 +5,8 @@
 #include "bench/BenchEdls.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
-#include "tests/core/TestProject.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/core/TestProject.h"
 
 #include <benchmark/benchmark.h>
 

@@ -7,8 +7,8 @@
 #include "core/model/DataModel.h"
 #include "core/serialize/ByteArchive.h"
 #include "fuzz/Check.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/TestProject.h"
 
 #include <algorithm>
 #include <cstddef>

@@ -10,8 +10,8 @@
 #include "core/model/DataModel.h"
 #include "core/serialize/ByteArchive.h"
 #include "fuzz/Check.h"
-#include "tests/core/TestProject.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/core/TestProject.h"
 
 #include <algorithm>
 #include <array>

@@ -7,8 +7,8 @@
 #include "core/fileio/CmxParser.h"
 #include "core/fileio/CmxWriter.h"
 #include "fuzz/Check.h"
-#include "tests/core/TestProject.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/core/TestProject.h"
 
 #include <algorithm>
 #include <cstddef>

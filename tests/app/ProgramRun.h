@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
 
 #include <string>
 #include <vector>

@@ -6,10 +6,10 @@
 #include "host/track/TrackRole.h"
 #include "standin/project/Track.h"
 #include "standin/services/IdleManager.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/host/AdaptedHost.h"
 #include "tests/host/FailingHost.h"
-#include "tests/host/services/WatchedProgress.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/host/AdaptedHost.h"
+#include "tests/support/host/WatchedProgress.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>

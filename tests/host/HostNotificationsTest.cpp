@@ -11,9 +11,9 @@
 #include "host/Host.h"
 #include "host/picture/VideoProvider.h"
 #include "host/project/Project.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/notify/RecordingListener.h"
-#include "tests/host/AdaptedHost.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/host/AdaptedHost.h"
 #include "util/StringUtil.h"
 #include "velmark/Attributes.h"
 

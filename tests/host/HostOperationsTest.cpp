@@ -10,9 +10,9 @@
 #include "host/picture/VideoProvider.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/host/AdaptedHost.h"
-#include "tests/host/track/FakeProject.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/host/AdaptedHost.h"
+#include "tests/support/host/FakeProject.h"
 #include "velmark/Attributes.h"
 #include "velmark/Tracks.h"
 

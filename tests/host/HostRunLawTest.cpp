@@ -14,8 +14,8 @@
 #include "standin/edit/EditService.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
-#include "tests/standin/Heard.h"
-#include "tests/standin/RandomProject.h"
+#include "tests/support/standin/Heard.h"
+#include "tests/support/standin/RandomProject.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>

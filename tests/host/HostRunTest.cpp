@@ -8,10 +8,10 @@
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
 #include "standin/services/IdleManager.h"
-#include "tests/core/notify/RecordingListener.h"
-#include "tests/host/AdaptedHost.h"
-#include "tests/host/services/WatchedProgress.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/host/AdaptedHost.h"
+#include "tests/support/host/WatchedProgress.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/Transport.h"
 
 #include <gtest/gtest.h>

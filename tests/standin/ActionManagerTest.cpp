@@ -2,7 +2,7 @@
 
 #include "standin/services/ActionManager.h"
 
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 
 #include <gtest/gtest.h>
 

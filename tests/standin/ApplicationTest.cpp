@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/standin/TestHost.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/standin/TestHost.h"
 
 #include "standin/file/ProjectFile.h"
 #include "velmark/Attributes.h"

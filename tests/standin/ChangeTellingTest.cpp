@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 
 #include "standin/services/DependencyManager.h"
 #include "velmark/Attributes.h"

@@ -2,8 +2,8 @@
 
 // Laws of undo for random projects and random edits, made through the interfaces as a module makes them.
 
-#include "tests/standin/RandomProject.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/RandomProject.h"
+#include "tests/support/standin/TestHost.h"
 
 #include "standin/ProjectManager.h"
 #include "standin/edit/EditService.h"

@@ -3,7 +3,7 @@
 #include "standin/services/HostContext.h"
 
 #include "standin/services/AlertService.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/Attributes.h"
 #include "velmark/Automation.h"
 #include "velmark/Events.h"

@@ -2,7 +2,7 @@
 
 // What large projects cost. A step that is quadratic in clips would take sixteen times as long for four times as many.
 
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 
 #include "standin/project/Track.h"
 #include "velmark/Events.h"

@@ -9,8 +9,8 @@
 #include "standin/project/Envelope.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Track.h"
-#include "tests/standin/ProjectText.h"
-#include "tests/standin/RandomProject.h"
+#include "tests/support/standin/ProjectText.h"
+#include "tests/support/standin/RandomProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>

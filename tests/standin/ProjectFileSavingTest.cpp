@@ -5,11 +5,11 @@
 #include "standin/file/ProjectFile.h"
 
 #include "standin/project/Project.h"
-#include "tests/standin/RandomProject.h"
-#include "tests/util/ChildProcess.h"
-#include "tests/util/FileSizeLimit.h"
-#include "tests/util/NoPrivileges.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/ChildProcess.h"
+#include "tests/support/FileSizeLimit.h"
+#include "tests/support/NoPrivileges.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/standin/RandomProject.h"
 
 #include <gtest/gtest.h>
 

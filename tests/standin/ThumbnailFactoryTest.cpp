@@ -3,7 +3,7 @@
 #include "standin/services/ThumbnailFactory.h"
 
 #include "standin/services/BitmapFont.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 
 #include <gtest/gtest.h>
 

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 
 #include "standin/project/Track.h"
 #include "velmark/Automation.h"

@@ -2,7 +2,7 @@
 
 #include "standin/services/Translations.h"
 
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
 #include "velmark/Counted.h"
 
 #include <gtest/gtest.h>

@@ -2,7 +2,7 @@
 
 #include "standin/services/Transport.h"
 
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/Transport.h"
 
 #include <gtest/gtest.h>

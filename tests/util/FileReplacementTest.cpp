@@ -2,11 +2,11 @@
 
 #include "util/FileReplacement.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/util/ChildProcess.h"
-#include "tests/util/FileSizeLimit.h"
-#include "tests/util/NoPrivileges.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/ChildProcess.h"
+#include "tests/support/FileSizeLimit.h"
+#include "tests/support/NoPrivileges.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/ThrownResult.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>

@@ -2,7 +2,7 @@
 
 #include "util/Result.h"
 
-#include "tests/core/ThrownResult.h"
+#include "tests/support/ThrownResult.h"
 
 #include <gtest/gtest.h>
 

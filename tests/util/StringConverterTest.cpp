@@ -2,8 +2,8 @@
 
 #include "util/StringConverter.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/util/PlainConverter.h"
+#include "tests/support/PlainConverter.h"
+#include "tests/support/ThrownResult.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>

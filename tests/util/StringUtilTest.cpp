@@ -2,8 +2,8 @@
 
 #include "util/StringUtil.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/ThrownResult.h"
 #include "util/Result.h"
 #include "util/StringConverter.h"
 

@@ -7,9 +7,9 @@
 #include "core/edl/HealedEvent.h"
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 
@@ -77,7 +77,6 @@ EventList generated(const std::vector<Event>& oldEvents, const std::vector<Event
 
 TEST(ChangeEdlGenerator, IdenticalListsGiveOneEventPerValidEventInTheOrderOfTheNewProgramme)
 {
-    const TestProject project;
     const Event unreadable = makeEvent("C", "00:03:00:00", "00:03:10:00", "01:00:40:00", "01:00:50:00");
     unreadable->addFlaw(core::EventFlaw::RollNameInvalid);
     const std::vector<Event> programme = {
@@ -98,8 +97,6 @@ TEST(ChangeEdlGenerator, IdenticalListsGiveOneEventPerValidEventInTheOrderOfTheN
 //  new programme     |----- A -------|
 TEST(ChangeEdlGenerator, AClipShortenedAtItsHeadStartsLaterInTheOldProgramme)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")},
                                         {makeEvent("A", "00:01:02:00", "00:01:10:00", "01:00:00:00", "01:00:08:00")});
 
@@ -108,8 +105,6 @@ TEST(ChangeEdlGenerator, AClipShortenedAtItsHeadStartsLaterInTheOldProgramme)
 
 TEST(ChangeEdlGenerator, AClipLengthenedAtItsHeadStartsLaterInTheNewProgramme)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:02:00", "00:01:10:00", "01:00:00:00", "01:00:08:00")},
                                         {makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
 
@@ -120,8 +115,6 @@ TEST(ChangeEdlGenerator, AClipLengthenedAtItsHeadStartsLaterInTheNewProgramme)
 //  new programme   |---- A2 ----|-- X --|---- A1 ----|
 TEST(ChangeEdlGenerator, AClipCutInTwoGivesTwoEventsInTheOrderOfTheNewProgramme)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:00:00", "00:01:20:00", "01:00:00:00", "01:00:20:00")},
                                         {makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:15:00", "01:00:25:00"),
                                          makeEvent("X", "00:01:00:00", "00:01:05:00", "01:00:10:00", "01:00:15:00"),
@@ -133,8 +126,6 @@ TEST(ChangeEdlGenerator, AClipCutInTwoGivesTwoEventsInTheOrderOfTheNewProgramme)
 
 TEST(ChangeEdlGenerator, OneNewEventOverTwoOldOnesGivesTwoEventsInTheOrderOfTheOldList)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:10:00", "00:01:20:00", "01:00:00:00", "01:00:10:00"),
                                          makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:30:00", "01:00:40:00")},
                                         {makeEvent("A", "00:01:00:00", "00:01:20:00", "01:00:00:00", "01:00:20:00")});
@@ -145,8 +136,6 @@ TEST(ChangeEdlGenerator, OneNewEventOverTwoOldOnesGivesTwoEventsInTheOrderOfTheO
 
 TEST(ChangeEdlGenerator, RangesThatOnlyTouchDoNotMatch)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")},
                                         {makeEvent("A", "00:01:10:00", "00:01:20:00", "01:00:00:00", "01:00:10:00")});
 
@@ -155,7 +144,6 @@ TEST(ChangeEdlGenerator, RangesThatOnlyTouchDoNotMatch)
 
 TEST(ChangeEdlGenerator, AnEmptyRangeMatchesNothingThatLiesAroundIt)
 {
-    const TestProject project;
     const Event empty = makeEvent("A", "00:01:05:00", "00:01:05:00", "01:00:05:00", "01:00:05:00");
     const Event around = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
 
@@ -165,8 +153,6 @@ TEST(ChangeEdlGenerator, AnEmptyRangeMatchesNothingThatLiesAroundIt)
 
 TEST(ChangeEdlGenerator, TheSameMaterialUnderAnotherNameDoesNotMatch)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")},
                                         {makeEvent("B", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
 
@@ -175,7 +161,6 @@ TEST(ChangeEdlGenerator, TheSameMaterialUnderAnotherNameDoesNotMatch)
 
 TEST(ChangeEdlGenerator, OfTwoOldPlacesTheOneWithMoreOfTheMaterialWins)
 {
-    const TestProject project;
     const Event shorter = makeEvent("A", "00:01:00:00", "00:01:05:00", "01:00:00:00", "01:00:05:00");
     const Event longer = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:30:00:00", "01:30:10:00");
     const Event placed = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
@@ -187,7 +172,6 @@ TEST(ChangeEdlGenerator, OfTwoOldPlacesTheOneWithMoreOfTheMaterialWins)
 
 TEST(ChangeEdlGenerator, OfTwoEqualPlacesTheOneThatContinuesThePlacementBeforeWins)
 {
-    const TestProject project;
     const Event oldLead = makeEvent("B", "00:02:00:00", "00:02:10:00", "01:00:00:00", "01:00:10:00");
     const Event oldNear = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:10:00", "01:00:20:00");
     const Event oldFar = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:02:00:00", "01:02:10:00");
@@ -206,7 +190,6 @@ TEST(ChangeEdlGenerator, OfTwoEqualPlacesTheOneThatContinuesThePlacementBeforeWi
 
 TEST(ChangeEdlGenerator, AtAnExactTieTheLaterOldEventWins)
 {
-    const TestProject project;
     const Event before = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
     const Event behind = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:40:00", "01:00:50:00");
     const Event placed = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:20:00", "01:00:30:00");
@@ -219,7 +202,6 @@ TEST(ChangeEdlGenerator, AtAnExactTieTheLaterOldEventWins)
 
 TEST(ChangeEdlGenerator, OfAnOldEventThatIsListedTwiceTheLaterOneStands)
 {
-    const TestProject project;
     const auto listed = [] { return makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"); };
     const Event between = makeEvent("A", "00:01:10:00", "00:01:20:00", "01:30:00:00", "01:30:10:00");
     const Event placedBefore = makeEvent("A", "00:01:00:00", "00:01:20:00", "00:10:00:00", "00:10:20:00");
@@ -239,8 +221,6 @@ TEST(ChangeEdlGenerator, OfAnOldEventThatIsListedTwiceTheLaterOneStands)
 //                                         |-3-|
 TEST(ChangeEdlGenerator, InAChainOfOverlapsTheLongestLeavesRoomForNoneThatItTouches)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:00:00", "00:01:08:00", "01:00:00:00", "01:00:08:00"),
                                          makeEvent("A", "00:01:06:00", "00:01:15:00", "01:01:00:00", "01:01:09:00"),
                                          makeEvent("A", "00:01:14:00", "00:01:18:00", "01:02:00:00", "01:02:04:00")},
@@ -256,8 +236,6 @@ TEST(ChangeEdlGenerator, InAChainOfOverlapsTheLongestLeavesRoomForNoneThatItTouc
 //                                        |-3--|
 TEST(ChangeEdlGenerator, InAChainOfOverlapsTheEndsSurviveTheShortestInTheMiddle)
 {
-    const TestProject project;
-
     const EventList changes = generated({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"),
                                          makeEvent("A", "00:01:08:00", "00:01:12:00", "01:01:00:00", "01:01:04:00"),
                                          makeEvent("A", "00:01:10:00", "00:01:18:00", "01:02:00:00", "01:02:08:00")},
@@ -271,8 +249,6 @@ TEST(ChangeEdlGenerator, InAChainOfOverlapsTheEndsSurviveTheShortestInTheMiddle)
 //  new programme   |/////|---------- A --------|
 TEST(ChangeEdlGenerator, UnderANewDissolveTheTimeOfTheTransitionIsMissing)
 {
-    const TestProject project;
-
     const EventList changes =
         generated({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")},
                   {makeTransition(TransitionType::Dissolve, 25,
@@ -284,7 +260,6 @@ TEST(ChangeEdlGenerator, UnderANewDissolveTheTimeOfTheTransitionIsMissing)
 
 TEST(ChangeEdlGenerator, TransitionsOfDifferentTypeOrLengthDoNotMatch)
 {
-    const TestProject project;
     const auto placed = [](TransitionType::Type type, int frames) {
         return makeTransition(type, frames, makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"));
     };
@@ -299,7 +274,6 @@ TEST(ChangeEdlGenerator, TransitionsOfDifferentTypeOrLengthDoNotMatch)
 
 TEST(ChangeEdlGenerator, ATransitionInOneLineKeepsItsNameAndIsNotMergedWithItsBody)
 {
-    const TestProject project;
     const Event oldWipe = makeTransition(TransitionType::Wipe, 25,
                                          makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"));
     const Event newWipe = makeTransition(TransitionType::Wipe, 25,
@@ -327,7 +301,6 @@ std::vector<Event> makeDissolve(const std::string& fromRoll, const char* dstIn, 
 
 TEST(ChangeEdlGenerator, TheSameDissolveOnBothSidesIsMergedIntoOneEventOfItsBody)
 {
-    const TestProject project;
     std::vector<Event> oldEvents = makeDissolve("A", "01:00:05:00", "01:00:15:00");
     oldEvents.push_back(makeEvent("C", "00:03:00:00", "00:03:05:00", "01:00:15:00", "01:00:20:00", 3));
     std::vector<Event> newEvents = makeDissolve("A", "01:00:25:00", "01:00:35:00");
@@ -346,8 +319,6 @@ TEST(ChangeEdlGenerator, TheSameDissolveOnBothSidesIsMergedIntoOneEventOfItsBody
 
 TEST(ChangeEdlGenerator, TheSameDissolveIsMergedByItsClipNamesToo)
 {
-    const TestProject project;
-
     const EventList changes = generated(makeDissolve("A", "01:00:05:00", "01:00:15:00"),
                                         makeDissolve("A", "01:00:25:00", "01:00:35:00"), MatchBy::ClipName);
 
@@ -357,8 +328,6 @@ TEST(ChangeEdlGenerator, TheSameDissolveIsMergedByItsClipNamesToo)
 
 TEST(ChangeEdlGenerator, ADissolveFromAnotherShotKeepsOnlyItsBody)
 {
-    const TestProject project;
-
     const EventList changes =
         generated(makeDissolve("A", "01:00:05:00", "01:00:15:00"), makeDissolve("X", "01:00:25:00", "01:00:35:00"));
 
@@ -367,7 +336,6 @@ TEST(ChangeEdlGenerator, ADissolveFromAnotherShotKeepsOnlyItsBody)
 
 TEST(ChangeEdlGenerator, ATransitionWhoseBodyComesFromElsewhereKeepsItsOwnNameAndBecomesACut)
 {
-    const TestProject project;
     std::vector<Event> oldEvents = makeDissolve("A", "01:00:05:00", "01:00:15:00");
     oldEvents.push_back(makeEvent("B", "00:02:00:00", "00:02:20:00", "01:00:30:00", "01:00:50:00", 3));
 
@@ -383,7 +351,6 @@ TEST(ChangeEdlGenerator, ATransitionWhoseBodyComesFromElsewhereKeepsItsOwnNameAn
 
 TEST(ChangeEdlGenerator, ATransitionLongerThanItsEventTakesAllOfIt)
 {
-    const TestProject project;
     std::vector<Event> oldEvents = makeDissolve("A", "01:00:05:00", "01:00:15:00");
     std::vector<Event> newEvents = makeDissolve("A", "01:00:25:00", "01:00:35:00");
     oldEvents.back()->setTransitionDuration(500);
@@ -399,7 +366,6 @@ TEST(ChangeEdlGenerator, ATransitionLongerThanItsEventTakesAllOfIt)
 // The source piece is the duration divided by the speed: 1 s of the source for 2 s of the programme.
 TEST(ChangeEdlGenerator, TheTransitionOfAFastEventTakesAShorterSource)
 {
-    const TestProject project;
     const Event fast = makeTransition(TransitionType::Dissolve, 50,
                                       makeEvent("A", "00:01:00:00", "00:01:12:00", "01:00:00:00", "01:00:06:00"));
     const Event likeItsBody = makeEvent("A", "00:01:01:00", "00:01:12:00", "01:01:40:00", "01:01:44:00");
@@ -411,7 +377,6 @@ TEST(ChangeEdlGenerator, TheTransitionOfAFastEventTakesAShorterSource)
 
 TEST(ChangeEdlGenerator, TheTransitionOfAFreezeFrameTakesNoSource)
 {
-    const TestProject project;
     const Event freeze = makeTransition(TransitionType::Dissolve, 25,
                                         makeEvent("A", "00:01:00:00", "00:01:00:00", "01:00:00:00", "01:00:04:00"));
 
@@ -420,7 +385,6 @@ TEST(ChangeEdlGenerator, TheTransitionOfAFreezeFrameTakesNoSource)
 
 TEST(ChangeEdlGenerator, OtherTransitionTypesStayWhole)
 {
-    const TestProject project;
     const auto key = [] {
         const Event event = makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
         event->setTransitionType(3);
@@ -436,7 +400,6 @@ TEST(ChangeEdlGenerator, OtherTransitionTypesStayWhole)
 
 TEST(ChangeEdlGenerator, WithoutClipNamesMatchingByThemComparesEverythingByItsSource)
 {
-    const TestProject project;
     const std::vector<Event> oldEvents = {makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"),
                                           makeEvent("B", "00:02:00:00", "00:02:10:00", "01:00:10:00", "01:00:20:00")};
 
@@ -448,7 +411,6 @@ TEST(ChangeEdlGenerator, WithoutClipNamesMatchingByThemComparesEverythingByItsSo
 
 TEST(ChangeEdlGenerator, AnyOtherMatchSettingComparesRollNames)
 {
-    const TestProject project;
     const Event oldEvent = withClip("one", makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"));
     const Event newEvent = withClip("two", makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:05:00", "01:00:15:00"));
 
@@ -459,7 +421,6 @@ TEST(ChangeEdlGenerator, AnyOtherMatchSettingComparesRollNames)
 
 TEST(ChangeEdlGenerator, AChangeEventBearsTheNamesOfTheNewEvent)
 {
-    const TestProject project;
     const Event oldEvent = withClip("old", makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"));
     const Event newEvent = withClip("new", makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:05:00", "01:00:15:00"));
     newEvent->setEdlFileName("reel3_v12.edl");
@@ -476,7 +437,6 @@ TEST(ChangeEdlGenerator, AChangeEventBearsTheNamesOfTheNewEvent)
 
 TEST(ChangeEdlGenerator, AFreezeFrameHasNoSourceAndNeverMatches)
 {
-    const TestProject project;
     const Event freeze = makeEvent("A", "00:01:00:00", "00:01:00:00", "01:00:00:00", "01:00:04:00");
     ASSERT_EQ(freeze->motionSpeed(), 0.0);
 
@@ -485,7 +445,6 @@ TEST(ChangeEdlGenerator, AFreezeFrameHasNoSourceAndNeverMatches)
 
 TEST(ChangeEdlGenerator, ANearlyFrozenShotLastsAsLongAsTheShorterOfTheTwo)
 {
-    const TestProject project;
     // One frame over 200, and over 125.
     const Event longer = makeEvent("A", "00:01:00:00", "00:01:00:01", "01:00:00:00", "01:00:08:00");
     const Event shorter = makeEvent("A", "00:01:00:00", "00:01:00:01", "01:00:30:00", "01:00:35:00");
@@ -496,7 +455,6 @@ TEST(ChangeEdlGenerator, ANearlyFrozenShotLastsAsLongAsTheShorterOfTheTwo)
 
 TEST(ChangeEdlGenerator, ANearlyFrozenShotStartsAtTheStartOfBothEvents)
 {
-    const TestProject project;
     // Two frames over 400, and the second of them over 200.
     const Event oldFreeze = makeEvent("A", "00:01:00:00", "00:01:00:02", "01:00:00:00", "01:00:16:00");
     const Event newFreeze = makeEvent("A", "00:01:00:01", "00:01:00:02", "01:00:30:00", "01:00:38:00");
@@ -509,7 +467,6 @@ TEST(ChangeEdlGenerator, ANearlyFrozenShotStartsAtTheStartOfBothEvents)
 // So both places are ten seconds less a frame away, and the later one wins the tie.
 TEST(ChangeEdlGenerator, ANearlyFrozenShotIsPlacedByTheOffsetInItsSource)
 {
-    const TestProject project;
     const Event aFrameLater = makeEvent("A", "00:01:00:01", "00:01:00:03", "01:00:10:01", "01:00:26:01");
     const Event aFrameIntoIt = makeEvent("A", "00:01:00:00", "00:01:00:03", "01:00:10:00", "01:00:34:00");
     const Event placed = makeEvent("A", "00:01:00:01", "00:01:00:03", "01:00:20:00", "01:00:36:00");
@@ -520,7 +477,6 @@ TEST(ChangeEdlGenerator, ANearlyFrozenShotIsPlacedByTheOffsetInItsSource)
 
 TEST(ChangeEdlGenerator, TheSourceOfAFastShotIsTurnedIntoProgrammeTime)
 {
-    const TestProject project;
     const Event oldFast = makeEvent("A", "00:01:00:00", "00:01:20:00", "01:00:00:00", "01:00:10:00");
     const Event newFast = makeEvent("A", "00:01:04:00", "00:01:20:00", "01:00:30:00", "01:00:38:00");
 
@@ -530,7 +486,6 @@ TEST(ChangeEdlGenerator, TheSourceOfAFastShotIsTurnedIntoProgrammeTime)
 
 TEST(ChangeEdlGenerator, ASpeedThatCountsAsNormalLeavesTheSourceAsItIs)
 {
-    const TestProject project;
     // 201 frames over 200 are a speed of 1.005.
     const Event oldEvent = makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00");
     const Event newEvent = makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:30:00", "01:00:38:00");
@@ -541,7 +496,6 @@ TEST(ChangeEdlGenerator, ASpeedThatCountsAsNormalLeavesTheSourceAsItIs)
 
 TEST(ChangeEdlGenerator, SpeedsMatchWhenTheyAreCloserThanAHundredth)
 {
-    const TestProject project;
     const Event twoHundredths = makeEvent("A", "00:01:00:00", "00:01:00:02", "01:00:00:00", "01:00:04:00");
     const Event oneHundredth = makeEvent("A", "00:01:00:00", "00:01:00:01", "01:00:00:00", "01:00:04:00");
     const Event between = makeEvent("A", "00:01:00:00", "00:01:00:02", "01:00:00:00", "01:00:06:00");
@@ -556,7 +510,6 @@ TEST(ChangeEdlGenerator, SpeedsMatchWhenTheyAreCloserThanAHundredth)
 
 TEST(ChangeEdlGenerator, VersionsOfAVfxShotAreOneNameAndAreMarked)
 {
-    const TestProject project;
     const Event oldShot = makeEvent("SHOT_1_V003_COMP", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
     const Event newShot = makeEvent("SHOT_1_V012_COMP", "00:01:00:00", "00:01:10:00", "01:00:20:00", "01:00:30:00");
     const std::vector<VfxPatternEntry> rows = {VfxPatternEntry("SHOT_*_V", "_COMP", true)};
@@ -570,7 +523,6 @@ TEST(ChangeEdlGenerator, VersionsOfAVfxShotAreOneNameAndAreMarked)
 
 TEST(ChangeEdlGenerator, ANameThatFitsAPatternWithoutAVersionIsNoVfxShot)
 {
-    const TestProject project;
     const Event shot = makeEvent("SHOT_1_V_COMP", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
     shot->setVfx(true);
     const Event version = makeEvent("SHOT_1_V7_COMP", "00:01:00:00", "00:01:10:00", "01:00:20:00", "01:00:30:00");
@@ -587,7 +539,6 @@ TEST(ChangeEdlGenerator, ANameThatFitsAPatternWithoutAVersionIsNoVfxShot)
 
 TEST(ChangeEdlGenerator, DisabledAndEmptyRowsAreNoPatterns)
 {
-    const TestProject project;
     const Event oldShot = makeEvent("VFX_1", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
     const Event newShot = makeEvent("VFX_2", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00");
     const VfxPatternEntry disabled("VFX_", "", false);
@@ -601,7 +552,6 @@ TEST(ChangeEdlGenerator, DisabledAndEmptyRowsAreNoPatterns)
 
 TEST(ChangeEdlGenerator, ConfiguringAgainForgetsTheFormerPatterns)
 {
-    const TestProject project;
     const EventList oldEvents =
         listOf({makeEvent("VFX_1", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
     const EventList newEvents =
@@ -630,11 +580,8 @@ TEST(ChangeEdlGenerator, ARowWithAForbiddenCharacterFails)
 
 TEST(ChangeEdlGenerator, WithoutAFramerateNothingIsGenerated)
 {
-    EventList programme;
-    {
-        const TestProject project;
-        programme = listOf({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
-    }
+    const EventList programme = listOf({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
+    const NoProject none;
     EventList changes;
 
     EXPECT_EQ(thrownBy([&] { ChangeEdlGenerator().generate(programme, programme, changes); }), Result::NotAvailable);
@@ -642,7 +589,6 @@ TEST(ChangeEdlGenerator, WithoutAFramerateNothingIsGenerated)
 
 TEST(ChangeEdlGenerator, AStretchThatLeavesTheDayFails)
 {
-    const TestProject project;
     // 201 frames of the source count as programme time, and the new programme has room for 200.
     const EventList oldEvents = listOf({makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00")});
     const EventList newEvents = listOf({makeEvent("A", "00:01:00:00", "00:01:08:01", "23:59:51:24", "23:59:59:24")});
@@ -654,7 +600,6 @@ TEST(ChangeEdlGenerator, AStretchThatLeavesTheDayFails)
 // Which of two old places wins is decided among stretches that both exist.
 TEST(ChangeEdlGenerator, AStretchThatLeavesTheDayFailsAlsoWhereAnotherOneWouldWin)
 {
-    const TestProject project;
     const EventList twins = listOf({makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00"),
                                     makeEvent("A", "00:01:00:00", "00:01:08:01", "23:59:51:24", "23:59:59:24")});
     const EventList placed = listOf({makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00")});
@@ -666,7 +611,6 @@ TEST(ChangeEdlGenerator, AStretchThatLeavesTheDayFailsAlsoWhereAnotherOneWouldWi
 // At half speed the second candidate reaches from 23:59:57 for four seconds; the first, of six seconds, overlaps it.
 TEST(ChangeEdlGenerator, AStretchWhoseSourceLeavesTheDayFailsAlsoWhereAnotherOneWouldWin)
 {
-    const TestProject project;
     const Event winner = makeEvent("A", "23:59:53:00", "23:59:56:00", "01:00:00:00", "01:00:06:00");
     const Event leaver = makeEvent("A", "23:59:55:00", "23:59:57:00", "01:01:00:00", "01:01:04:00");
     const EventList placed = listOf({makeEvent("A", "23:59:53:00", "23:59:57:00", "01:00:00:00", "01:00:08:00")});
@@ -682,7 +626,6 @@ TEST(ChangeEdlGenerator, AStretchWhoseSourceLeavesTheDayFailsAlsoWhereAnotherOne
 
 TEST(ChangeEdlGenerator, ATransitionThatLeavesTheDayFailsForAValidEvent)
 {
-    const TestProject project;
     const Event atTheEnd = makeTransition(TransitionType::Dissolve, 250,
                                           makeEvent("A", "23:59:59:00", "23:59:59:20", "01:00:00:00", "01:00:00:20"));
     const EventList plain = listOf({makeEvent("B", "00:01:00:00", "00:01:10:00", "01:00:10:00", "01:00:20:00")});
@@ -694,7 +637,6 @@ TEST(ChangeEdlGenerator, ATransitionThatLeavesTheDayFailsForAValidEvent)
 
 TEST(ChangeEdlGenerator, AnInvalidEventWhoseTransitionCannotBeCutOutTakesNoPart)
 {
-    const TestProject project;
     const Event atTheEnd = makeTransition(TransitionType::Dissolve, 250,
                                           makeEvent("A", "23:59:59:00", "23:59:59:20", "01:00:00:00", "01:00:00:20"));
     atTheEnd->addFlaw(core::EventFlaw::NotVideoEvent);
@@ -711,7 +653,6 @@ TEST(ChangeEdlGenerator, AnInvalidEventWhoseTransitionCannotBeCutOutTakesNoPart)
 // The piece ends within its event, so that nothing of it is out of the rate; the body keeps its SRC OUT.
 TEST(ChangeEdlGenerator, ThePieceOfADissolveWhoseSourceEndIsOutOfTheRateTakesPartAndItsBodyDoesNot)
 {
-    const TestProject project;
     const Event outOfRate = makeTransition(TransitionType::Dissolve, 25,
                                            makeEvent("A", "00:01:00:00", "00:01:10:29", "01:00:00:00", "01:00:10:00"));
     const Event intact = makeTransition(TransitionType::Dissolve, 25,
@@ -730,7 +671,6 @@ TEST(ChangeEdlGenerator, ThePieceOfADissolveWhoseSourceEndIsOutOfTheRateTakesPar
 // The timecodes of a copy count as set, which shows as soon as the transition is cut out of it.
 TEST(ChangeEdlGenerator, ADissolveWithAnUnsetTimecodeTakesPartAndACutWithOneDoesNot)
 {
-    const TestProject project;
     const auto withoutDstIn = [] {
         const auto event = std::make_shared<EventBase>();
         event->setRollName("A");
@@ -749,7 +689,6 @@ TEST(ChangeEdlGenerator, ADissolveWithAnUnsetTimecodeTakesPartAndACutWithOneDoes
 
 TEST(ChangeEdlGenerator, AnInvalidFirstLineOfADissolveStillGivesItsNameToThePiece)
 {
-    const TestProject project;
     std::vector<Event> dissolve = makeDissolve("A", "01:00:05:00", "01:00:15:00");
     dissolve.front()->setSrcOut(Timecode("00:00:05:29"));
     ASSERT_FALSE(dissolve.front()->isValid());
@@ -766,7 +705,6 @@ TEST(ChangeEdlGenerator, AnInvalidFirstLineOfADissolveStillGivesItsNameToThePiec
 
 TEST(ChangeEdlGenerator, ADissolveFromAnInvalidFirstLineIsMergedWithItsBody)
 {
-    const TestProject project;
     const auto fromUnreadable = [](const char* dstIn, const char* dstOut) {
         std::vector<Event> dissolve = makeDissolve("A", dstIn, dstOut);
         dissolve.front()->addFlaw(core::EventFlaw::NotVideoEvent);
@@ -780,7 +718,6 @@ TEST(ChangeEdlGenerator, ADissolveFromAnInvalidFirstLineIsMergedWithItsBody)
 
 TEST(ChangeEdlGenerator, NothingInCommonGivesAnEmptyListInPlaceOfTheFormer)
 {
-    const TestProject project;
     const EventList oldEvents = listOf({makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
     const EventList newEvents = listOf({makeEvent("B", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
     EventList changes = listOf({makeEvent("C", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00")});
@@ -793,7 +730,6 @@ TEST(ChangeEdlGenerator, NothingInCommonGivesAnEmptyListInPlaceOfTheFormer)
 
 TEST(ChangeEdlGenerator, AnInvalidEventOnEitherSideTakesNoPart)
 {
-    const TestProject project;
     const auto placed = [] { return makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"); };
     const Event unreadable = placed();
     unreadable->addFlaw(core::EventFlaw::SrcInUnreadable);
@@ -809,7 +745,6 @@ TEST(ChangeEdlGenerator, AnInvalidEventOnEitherSideTakesNoPart)
 
 TEST(ChangeEdlGenerator, TheInputsStayAsTheyAre)
 {
-    const TestProject project;
     const std::vector<Event> dissolve = makeDissolve("A", "01:00:05:00", "01:00:15:00");
     EventList oldEvents = listOf(dissolve);
     EventList newEvents = listOf(dissolve);
@@ -830,7 +765,6 @@ TEST(ChangeEdlGenerator, TheInputsStayAsTheyAre)
 
 TEST(ChangeEdlGenerator, AHealedEventTakesPartAsAPlainOne)
 {
-    const TestProject project;
     const auto healed = std::make_shared<core::HealedEvent>();
     healed->addEvent(makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"));
     healed->addEvent(makeEvent("A", "00:01:10:00", "00:01:20:00", "01:00:10:00", "01:00:20:00"));

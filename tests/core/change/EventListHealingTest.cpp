@@ -5,11 +5,11 @@
 #include "core/edl/HealedEvent.h"
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
 #include "tests/core/change/AmpleTime.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -84,7 +84,6 @@ const EventList NoReference;
 //  after    |------ 001 ------|   |--d--|--e--|
 TEST(EventListHeal, JoinsTheSelectionAndLeavesTheOthersApart)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event c = stretch(20, 10);
@@ -104,7 +103,6 @@ TEST(EventListHeal, JoinsTheSelectionAndLeavesTheOthersApart)
 
 TEST(EventListHeal, ModeNoneGivesBackTheMembersOfAHealedEvent)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event c = stretch(20, 10);
@@ -122,7 +120,6 @@ TEST(EventListHeal, ModeNoneGivesBackTheMembersOfAHealedEvent)
 
 TEST(EventListHeal, HealedEventsAreNamedInTheOrderOfTheNewProgramme)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event c = stretch(50, 10);
@@ -143,7 +140,6 @@ TEST(EventListHeal, HealedEventsAreNamedInTheOrderOfTheNewProgramme)
 
 TEST(EventListHeal, AHealedEventInTheSelectionIsHealedAnew)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event c = stretch(20, 10);
@@ -161,7 +157,6 @@ TEST(EventListHeal, AHealedEventInTheSelectionIsHealedAnew)
 //  new EDL              |i|
 TEST(EventListHeal, TheReferenceListShowsTheInserts)
 {
-    const TestProject project;
     const Events events = {stretch(0, 10), stretch(30, 10)};
     EventList withInsert = listOf(events);
     EventList withoutInsert = listOf(events);
@@ -175,7 +170,6 @@ TEST(EventListHeal, TheReferenceListShowsTheInserts)
 
 TEST(EventListHeal, SelectedEventsThatAreNotInTheListStayOut)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event stranger = stretch(10, 10);
     EventList list = listOf({a});
@@ -187,7 +181,6 @@ TEST(EventListHeal, SelectedEventsThatAreNotInTheListStayOut)
 
 TEST(EventListHeal, AnEmptySelectionSortsAndNumbersTheList)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     EventList list = listOf({b, a});
@@ -200,7 +193,6 @@ TEST(EventListHeal, AnEmptySelectionSortsAndNumbersTheList)
 
 TEST(EventListHeal, TheListAsItsOwnSelectionIsHealedWhole)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     EventList list = listOf({b, a});
@@ -213,7 +205,6 @@ TEST(EventListHeal, TheListAsItsOwnSelectionIsHealedWhole)
 
 TEST(EventListHeal, SendsOneNotificationAndListensToWhatTheListHoldsNow)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event c = stretch(50, 10);
@@ -256,7 +247,6 @@ TEST(EventListHeal, AFailureLosesNoEvent)
 
 TEST(EventListHeal, WithoutAConverterForTheNamesNoEventIsLost)
 {
-    const TestProject project;
     const Events events = {stretch(0, 10), stretch(10, 10), healedFrom({stretch(40, 5)})};
     EventList list = listOf(events);
     util::StringUtil::setConverter(nullptr);
@@ -272,7 +262,6 @@ TEST(EventListHeal, WithoutAConverterForTheNamesNoEventIsLost)
 
 TEST(EventListHeal, AFailureLeavesTheListDeafToItsEvents)
 {
-    const TestProject project;
     const Events events = {stretch(0, 10), stretch(10, 10)};
     EventList list = listOf(events);
     RecordingListener listener;
@@ -356,7 +345,6 @@ TEST(EventListCanHeal, AMemberThatHasBecomeInvalidCounts)
 
 TEST(EventListCanHeal, SaysWhetherTheNumberOfEventsWouldChange)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event c = stretch(30, 10);
@@ -372,7 +360,6 @@ TEST(EventListCanHeal, SaysWhetherTheNumberOfEventsWouldChange)
 
 TEST(EventListCanHeal, AHealedEventCanBeTakenApartButNotHealedTheSameWayAgain)
 {
-    const TestProject project;
     const Event healed = healedFrom({stretch(0, 10), stretch(10, 10), stretch(20, 10)});
     const Event withGap = healedFrom({stretch(100, 10), stretch(120, 10)});
     const EventList list = listOf({healed, withGap});
@@ -384,15 +371,12 @@ TEST(EventListCanHeal, AHealedEventCanBeTakenApartButNotHealedTheSameWayAgain)
 
 TEST(EventListCanHeal, AnEmptySelectionHasNothingToHeal)
 {
-    const TestProject project;
-
     EXPECT_FALSE(listOf({stretch(0, 10)}).canHeal(EventList(), NoReference, HealMode::Normal));
     EXPECT_FALSE(EventList().canHeal(EventList(), NoReference, HealMode::Normal));
 }
 
 TEST(EventListCanHeal, ASelectionWithAnEventLeftOutIsRefused)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event c = stretch(20, 10);
@@ -404,7 +388,6 @@ TEST(EventListCanHeal, ASelectionWithAnEventLeftOutIsRefused)
 
 TEST(EventListCanHeal, ASelectionThatIsNotInTheListIsRefused)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event stranger = stretch(10, 10);
@@ -417,7 +400,6 @@ TEST(EventListCanHeal, ASelectionThatIsNotInTheListIsRefused)
 //  |----b----|----c----|
 TEST(EventListCanHeal, NeighboursAreFoundByTheEventWhereTwoStartTogether)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(0, 10);
     const Event c = stretch(10, 10);
@@ -430,7 +412,6 @@ TEST(EventListCanHeal, NeighboursAreFoundByTheEventWhereTwoStartTogether)
 
 TEST(EventListCanHeal, ChangesNothingAndSendsNothing)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     const Event healed = healedFrom({a, b});
@@ -458,7 +439,6 @@ TEST(EventListHealingSpeed, ManyHealedEventsAreHealedAnewAndTakenApartInTime)
 {
     constexpr double AmpleSeconds = IsSanitized ? 30.0 : 5.0;
     constexpr int Many = 20000;
-    const TestProject project;
     EventList list;
     for (int i = 0; i < Many; ++i)
         list.add(healedFrom({stretch(5 * i, 2), stretch(5 * i + 2, 2)}));
@@ -480,7 +460,6 @@ TEST(EventListHealingSpeed, ManyHealedEventsAreHealedAnewAndTakenApartInTime)
 
 RC_GTEST_PROP(EventListCanHeal, AgreesWithHealOnTheNumberOfEvents, ())
 {
-    const TestProject project;
     EventList list;
     int end = 0;
     for (const int gap : *rc::gen::container<std::vector<int>>(rc::gen::element(0, 0, 3))) {
@@ -504,7 +483,6 @@ RC_GTEST_PROP(EventListCanHeal, AgreesWithHealOnTheNumberOfEvents, ())
 // Healing anew whatever was healed, in any mode, and taking it apart again gives the very events.
 RC_GTEST_PROP(EventListHeal, HealingCanAlwaysBeUndone, ())
 {
-    const TestProject project;
     EventList list;
     int end = 0;
     for (const int gap : *rc::gen::container<std::vector<int>>(rc::gen::element(0, 0, 3))) {
@@ -525,7 +503,6 @@ RC_GTEST_PROP(EventListHeal, HealingCanAlwaysBeUndone, ())
 //  after    |--a--|-----b-----|          |--c--|
 TEST(EventListExtend, UntilThePreviousEventTakesTheGapOnBothSides)
 {
-    const TestProject project;
     const Event a = makeEvent("A", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00");
     const Event b = makeEvent("B", "00:20:00:00", "00:20:05:00", "01:00:12:00", "01:00:17:00");
     const Event c = makeEvent("C", "00:30:00:00", "00:30:05:00", "01:00:30:00", "01:00:35:00");
@@ -543,7 +520,6 @@ TEST(EventListExtend, UntilThePreviousEventTakesTheGapOnBothSides)
 
 TEST(EventListExtend, UntilTheNextEventTakesTheGapOnBothSides)
 {
-    const TestProject project;
     const Event a = makeEvent("A", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00");
     const Event b = makeEvent("B", "00:20:00:00", "00:20:05:00", "01:00:12:00", "01:00:17:00");
     const Event c = makeEvent("C", "00:30:00:00", "00:30:05:00", "01:00:30:00", "01:00:35:00");
@@ -560,7 +536,6 @@ TEST(EventListExtend, UntilTheNextEventTakesTheGapOnBothSides)
 
 TEST(EventListExtend, WithoutANeighbourNothingChanges)
 {
-    const TestProject project;
     const Event a = stretch(100, 10);
     const Event b = stretch(150, 10);
     EventList list = listOf({a, b});
@@ -578,7 +553,6 @@ TEST(EventListExtend, WithoutANeighbourNothingChanges)
 
 TEST(EventListExtend, AnEventThatIsNotInTheListStaysAsItIs)
 {
-    const TestProject project;
     const Event stranger = stretch(150, 10);
     EventList list = listOf({stretch(0, 10), stretch(200, 10)});
     const std::string before = timecodesOf(*stranger);
@@ -594,7 +568,6 @@ TEST(EventListExtend, AnEventThatIsNotInTheListStaysAsItIs)
 
 TEST(EventListExtend, AnEventWithInvalidTimecodesHasNoNeighbours)
 {
-    const TestProject project;
     const Event outOfRate = makeEvent("A", "00:00:20:29", "00:00:21:00", "00:00:05:00", "00:00:06:00");
     EventList list = listOf({stretch(0, 10), outOfRate, stretch(200, 10)});
     const std::string before = timecodesOf(*outOfRate);
@@ -609,7 +582,6 @@ TEST(EventListExtend, AnEventWithInvalidTimecodesHasNoNeighbours)
 
 TEST(EventListExtend, EventsThatTouchCanNotBeExtended)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(10, 10);
     EventList list = listOf({a, b});
@@ -624,7 +596,6 @@ TEST(EventListExtend, EventsThatTouchCanNotBeExtended)
 
 TEST(EventListExtend, AnOverlapFailsAndLeavesTheEvent)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(5, 10);
     EventList list = listOf({a, b});
@@ -639,7 +610,6 @@ TEST(EventListExtend, AnOverlapFailsAndLeavesTheEvent)
 
 TEST(EventListExtend, ASourceThatWouldStartBeforeTheDayFailsAndLeavesTheEvent)
 {
-    const TestProject project;
     const Event a = makeEvent("A", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00");
     const Event b = makeEvent("B", "00:00:01:24", "00:00:06:24", "01:00:12:00", "01:00:17:00");
     EventList list = listOf({a, b});
@@ -653,7 +623,6 @@ TEST(EventListExtend, ASourceThatWouldStartBeforeTheDayFailsAndLeavesTheEvent)
 
 TEST(EventListExtend, ASourceThatWouldEndBehindTheDayFailsAndLeavesTheEvent)
 {
-    const TestProject project;
     const Event a = makeEvent("A", "23:59:50:00", "23:59:58:01", "01:00:00:00", "01:00:08:01");
     const Event b = makeEvent("B", "00:10:00:00", "00:10:10:00", "01:00:10:00", "01:00:20:00");
     EventList list = listOf({a, b});
@@ -679,7 +648,6 @@ TEST(EventListExtend, AskingNeverFails)
 
 TEST(EventListExtend, SendsOneNotificationAndListensAgain)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(50, 10);
     EventList list = listOf({a, b});
@@ -698,7 +666,6 @@ TEST(EventListExtend, SendsOneNotificationAndListensAgain)
 
 TEST(EventListExtend, AFailureLeavesTheListDeafToItsEvents)
 {
-    const TestProject project;
     const Event a = stretch(0, 10);
     const Event b = stretch(5, 10);
     EventList list = listOf({a, b});

@@ -7,9 +7,9 @@
 #include "core/edl/HealedEvent.h"
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -91,7 +91,6 @@ const Events& membersOf(const EventBase& event)
 
 TEST(HealProcessing, ModeNoneLeavesTheListUntouched)
 {
-    const TestProject project;
     const Event second = stretch(100, 100, 50);
     const Event first = stretch(50, 50, 50);
     second->setEventNumber(7);
@@ -107,7 +106,6 @@ TEST(HealProcessing, ModeNoneLeavesTheListUntouched)
 
 TEST(HealProcessing, AListOfOneEventKeepsItsNumber)
 {
-    const TestProject project;
     const Event alone = stretch(0, 0, 50);
     alone->setEventNumber(12);
     EventList list = listOf({alone});
@@ -123,7 +121,6 @@ TEST(HealProcessing, AListOfOneEventKeepsItsNumber)
 
 TEST(HealProcessing, ThreeEventsThatTouchOnBothSidesBecomeOne)
 {
-    const TestProject project;
     const Event a = stretch(1000, 0, 50);
     const Event b = stretch(1050, 50, 25);
     const Event c = stretch(1075, 75, 25);
@@ -146,8 +143,6 @@ TEST(HealProcessing, ThreeEventsThatTouchOnBothSidesBecomeOne)
 
 TEST(HealProcessing, NeighboursThatTouchOnOneSideAloneStayApart)
 {
-    const TestProject project;
-
     for (const std::int32_t mode : {HealMode::Normal, HealMode::GapsWithoutInserts, HealMode::GapsWithInserts}) {
         EXPECT_EQ(countHealed({stretch(0, 0, 50), stretch(50, 51, 50)}, mode), 2u);
         EXPECT_EQ(countHealed({stretch(0, 0, 50), stretch(51, 50, 50)}, mode), 2u);
@@ -156,8 +151,6 @@ TEST(HealProcessing, NeighboursThatTouchOnOneSideAloneStayApart)
 
 TEST(HealProcessing, NeighboursWithUnequalGapsAreNeverJoined)
 {
-    const TestProject project;
-
     for (const std::int32_t mode : {HealMode::Normal, HealMode::GapsWithoutInserts, HealMode::GapsWithInserts}) {
         EXPECT_EQ(countHealed({stretch(0, 0, 50), stretch(55, 54, 50)}, mode), 2u);
         EXPECT_EQ(countHealed({stretch(0, 0, 50), stretch(54, 55, 50)}, mode), 2u);
@@ -166,8 +159,6 @@ TEST(HealProcessing, NeighboursWithUnequalGapsAreNeverJoined)
 
 TEST(HealProcessing, NeighboursThatOverlapAreNeverJoined)
 {
-    const TestProject project;
-
     for (const std::int32_t mode : {HealMode::Normal, HealMode::GapsWithoutInserts, HealMode::GapsWithInserts}) {
         EXPECT_EQ(countHealed({stretch(0, 0, 50), stretch(40, 40, 50)}, mode), 2u);
         EXPECT_EQ(countHealed({stretch(0, 0, 50), stretch(40, 60, 50)}, mode), 2u);
@@ -178,7 +169,6 @@ TEST(HealProcessing, NeighboursThatOverlapAreNeverJoined)
 
 TEST(HealProcessing, AnEqualGapIsClosedByTheModesForGapsAlone)
 {
-    const TestProject project;
     const Events events = {stretch(1000, 0, 50), stretch(1060, 60, 50)};
 
     EXPECT_EQ(countHealed(events, HealMode::Normal), 2u);
@@ -188,7 +178,6 @@ TEST(HealProcessing, AnEqualGapIsClosedByTheModesForGapsAlone)
 
 TEST(HealProcessing, AHealedEventSpansTheGapsOfItsMembers)
 {
-    const TestProject project;
     EventList list = listOf({stretch(1000, 0, 50), stretch(1075, 75, 25)});
 
     heal(list, HealMode::GapsWithInserts);
@@ -201,7 +190,6 @@ TEST(HealProcessing, AHealedEventSpansTheGapsOfItsMembers)
 //                  0        50              100      150
 TEST(HealProcessing, AReferenceEventUpToTheGapOrFromItsEndIsNoInsert)
 {
-    const TestProject project;
     const Events events = {stretch(0, 0, 50), stretch(100, 100, 50)};
 
     EXPECT_EQ(countHealed(events, HealMode::GapsWithoutInserts, {stretch(0, 0, 50)}), 1u);
@@ -212,7 +200,6 @@ TEST(HealProcessing, AReferenceEventUpToTheGapOrFromItsEndIsNoInsert)
 
 TEST(HealProcessing, AReferenceEventWithinTheGapIsAnInsert)
 {
-    const TestProject project;
     const Events events = {stretch(0, 0, 50), stretch(100, 100, 50)};
     const auto countWith = [&](const Event& reference) {
         return countHealed(events, HealMode::GapsWithoutInserts, {stretch(0, 0, 50), reference, stretch(0, 100, 50)});
@@ -228,7 +215,6 @@ TEST(HealProcessing, AReferenceEventWithinTheGapIsAnInsert)
 
 TEST(HealProcessing, AReferenceEventThatCoversTheWholeGapIsAnInsert)
 {
-    const TestProject project;
     const Events events = {stretch(0, 0, 50), stretch(100, 100, 50)};
 
     EXPECT_EQ(countHealed(events, HealMode::GapsWithoutInserts, {stretch(0, 0, 200)}), 2u);
@@ -237,15 +223,12 @@ TEST(HealProcessing, AReferenceEventThatCoversTheWholeGapIsAnInsert)
 
 TEST(HealProcessing, NeighboursThatTouchLeaveNoRoomForAnInsert)
 {
-    const TestProject project;
-
     EXPECT_EQ(countHealed({stretch(0, 0, 50), stretch(50, 50, 50)}, HealMode::GapsWithoutInserts, {stretch(0, 20, 60)}),
               1u);
 }
 
 TEST(HealProcessing, WithInsertsTheyDoNotMatter)
 {
-    const TestProject project;
     const Events events = {stretch(0, 0, 50), stretch(100, 100, 50)};
 
     EXPECT_EQ(countHealed(events, HealMode::GapsWithInserts, {stretch(0, 60, 20)}), 1u);
@@ -254,7 +237,6 @@ TEST(HealProcessing, WithInsertsTheyDoNotMatter)
 
 TEST(HealProcessing, AnUnknownModeSortsAndNumbersWithoutJoining)
 {
-    const TestProject project;
     const Event second = stretch(50, 50, 50);
     const Event first = stretch(0, 0, 50);
     EventList list = listOf({second, first});
@@ -268,7 +250,6 @@ TEST(HealProcessing, AnUnknownModeSortsAndNumbersWithoutJoining)
 
 TEST(HealProcessing, WhenClipNamesMatchTheHealedEventHasAClipName)
 {
-    const TestProject project;
     for (const std::int32_t matchBy : {1, 2}) {
         EventList list = listOf({stretch(0, 0, 50), stretch(50, 50, 50)});
 
@@ -283,7 +264,6 @@ TEST(HealProcessing, WhenClipNamesMatchTheHealedEventHasAClipName)
 //  new programme   |--a--|--b--|  |--c--|     |--d--|--e--|--f--|
 TEST(HealProcessing, HealedEventsAreCountedAndAllEventsNumbered)
 {
-    const TestProject project;
     const Event a = stretch(0, 0, 10);
     const Event b = stretch(10, 10, 10);
     const Event c = stretch(500, 30, 10);
@@ -307,7 +287,6 @@ TEST(HealProcessing, HealedEventsAreCountedAndAllEventsNumbered)
 
 TEST(HealProcessing, ARunInTheMiddleIsClosedByTheEventBehindIt)
 {
-    const TestProject project;
     const Event a = stretch(900, 0, 10);
     const Event b = stretch(10, 10, 10);
     const Event c = stretch(20, 20, 10);
@@ -325,7 +304,6 @@ TEST(HealProcessing, ARunInTheMiddleIsClosedByTheEventBehindIt)
 
 TEST(HealProcessing, EventsOfEqualStartKeepTheOrderOfTheList)
 {
-    const TestProject project;
     const Event first = stretch(100, 50, 10);
     const Event second = stretch(0, 50, 10);
     const Event earlier = stretch(500, 0, 10);
@@ -338,7 +316,6 @@ TEST(HealProcessing, EventsOfEqualStartKeepTheOrderOfTheList)
 
 TEST(HealProcessing, EventsWithInvalidTimecodesDropOut)
 {
-    const TestProject project;
     const Event outOfRate = makeEvent("A", "00:00:02:00", "00:00:04:00", "00:00:02:29", "00:00:04:00");
     const Event before = stretch(0, 0, 50);
     const Event behind = stretch(50, 50, 50);
@@ -352,7 +329,6 @@ TEST(HealProcessing, EventsWithInvalidTimecodesDropOut)
 
 TEST(HealProcessing, EveryOtherFlawLeavesAnEventIn)
 {
-    const TestProject project;
     const Event flawed = stretch(50, 50, 50);
     flawed->addFlaw(core::EventFlaw::NotVideoEvent);
 
@@ -361,8 +337,6 @@ TEST(HealProcessing, EveryOtherFlawLeavesAnEventIn)
 
 TEST(HealProcessing, ANameHasAtLeastThreeDigits)
 {
-    const TestProject project;
-
     EXPECT_EQ(HealProcessing::healedEventName(1), "Healed Event 001");
     EXPECT_EQ(HealProcessing::healedEventName(42), "Healed Event 042");
     EXPECT_EQ(HealProcessing::healedEventName(1234), "Healed Event 1234");
@@ -370,7 +344,6 @@ TEST(HealProcessing, ANameHasAtLeastThreeDigits)
 
 TEST(HealProcessing, CountingChangesNothing)
 {
-    const TestProject project;
     const Event second = stretch(50, 50, 50);
     const Event first = stretch(0, 0, 50);
     second->setEventNumber(7);
@@ -389,7 +362,6 @@ TEST(HealProcessing, CountingChangesNothing)
 
 TEST(HealProcessing, WithoutAConverterForTheNameTheListKeepsItsEvents)
 {
-    const TestProject project;
     const Events events = {stretch(50, 50, 50), stretch(0, 0, 50)};
     EventList list = listOf(events);
     const EventList reference;
@@ -431,7 +403,6 @@ TEST(HealProcessing, ARateThatTheTimecodesDoNotFitFailsAndTheListKeepsItsEvents)
 
 TEST(HealProcessing, AReversedEventBesideAnotherIsNoFailure)
 {
-    const TestProject project;
     const Event reversed = makeEvent("A", "00:00:03:15", "00:00:02:10", "00:00:03:15", "00:00:02:10");
 
     EXPECT_EQ(countHealed({stretch(0, 0, 50), reversed, stretch(200, 200, 50)}, HealMode::GapsWithInserts), 1u);
@@ -489,7 +460,6 @@ bool needsNoCut(const EventBase& earlier, const EventBase& later, std::int32_t m
 
 RC_GTEST_PROP(HealProcessing, JoinsExactlyTheNeighboursThatNeedNoCut, ())
 {
-    const TestProject project;
     const Events row = rowOf(*anyRow());
     const Events reference = rowOf(*anyRow());
     const auto mode =
@@ -521,7 +491,6 @@ RC_GTEST_PROP(HealProcessing, JoinsExactlyTheNeighboursThatNeedNoCut, ())
 
 RC_GTEST_PROP(HealProcessing, AHealedListCoversWhatItsMembersCovered, ())
 {
-    const TestProject project;
     EventList list = listOf(rowOf(*anyRow()));
     const auto mode = *rc::gen::inRange<std::int32_t>(HealMode::None, HealMode::GapsWithInserts + 1);
     const Events before = list.events();

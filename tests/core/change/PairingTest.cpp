@@ -5,10 +5,10 @@
 #include "core/edl/EventList.h"
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
-#include "tests/core/TestProject.h"
 #include "tests/core/change/AmpleTime.h"
 #include "tests/core/change/PairwiseGenerator.h"
-#include "tests/core/edl/EventMaking.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/TestProject.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>
@@ -420,7 +420,6 @@ void expectChange(const EventBase& event, int number, int oldIn, int newIn, int 
 
 TEST(PairingSpeed, DistinctMaterialUnderOneNameIsFoundAtItsPlace)
 {
-    const TestProject project;
     const EventList oldEvents = rowOfShots(ManyEvents, [](int i) { return i * ShotLength; });
     const EventList newEvents = rowOfShots(ManyEvents, [](int i) { return (ManyEvents - 1 - i) * ShotLength; });
 
@@ -438,7 +437,6 @@ TEST(PairingSpeed, DistinctMaterialUnderOneNameIsFoundAtItsPlace)
 //  new programme   |--- A to M ---|N|O| ... |Z|
 TEST(PairingSpeed, ALongNewShotGivesAnEventForEachOldShotInIt)
 {
-    const TestProject project;
     constexpr int Covered = ManyEvents / 2;
     const EventList oldEvents = rowOfShots(ManyEvents, [](int i) { return i * ShotLength; });
     EventList newEvents;
@@ -456,7 +454,6 @@ TEST(PairingSpeed, ALongNewShotGivesAnEventForEachOldShotInIt)
 
 TEST(PairingSpeed, ALongOldShotGivesAnEventForEachNewShotInIt)
 {
-    const TestProject project;
     constexpr int Covered = ManyEvents / 2;
     EventList oldEvents;
     oldEvents.add(makeShot(0, 0, Covered * ShotLength));
@@ -477,7 +474,6 @@ TEST(PairingSpeed, ALongOldShotGivesAnEventForEachNewShotInIt)
 // Every old place fits every new one; the placement before decides, which starts with no displacement.
 TEST(PairingSpeed, TheSameStretchInManyPlacesStaysWhereItWas)
 {
-    const TestProject project;
     const EventList oldEvents = rowOfShots(ManyEvents, [](int) { return 0; });
     const EventList newEvents = rowOfShots(ManyEvents, [](int) { return 0; });
 
@@ -493,7 +489,6 @@ TEST(PairingSpeed, TheSameStretchInManyPlacesStaysWhereItWas)
 // on each keeps that displacement.
 TEST(PairingSpeed, TheSameStretchInManyPlacesKeepsItsDisplacement)
 {
-    const TestProject project;
     constexpr int Offset = 7;
     const EventList oldEvents = rowOfShots(ManyEvents, [](int) { return 0; });
     EventList newEvents;

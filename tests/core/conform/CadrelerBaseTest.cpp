@@ -4,9 +4,9 @@
 
 #include "core/cut/Cut.h"
 #include "core/cut/CutList.h"
-#include "tests/core/conform/ConformFilm.h"
-#include "tests/core/conform/MemoryEngine.h"
-#include "tests/core/conform/RecordingProgress.h"
+#include "tests/support/core/ConformFilm.h"
+#include "tests/support/core/MemoryEngine.h"
+#include "tests/support/core/RecordingProgress.h"
 #include "util/StringUtil.h"
 
 #include <gtest/gtest.h>

@@ -5,7 +5,7 @@
 // nothing.
 
 #include "core/time/Timecode.h"
-#include "tests/core/conform/ConformFilm.h"
+#include "tests/support/core/ConformFilm.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>

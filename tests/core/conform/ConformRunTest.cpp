@@ -3,7 +3,7 @@
 // Runs from end to end: the film goes in as clips and curves on tracks and comes out conformed, with its markers.
 
 #include "core/cut/MarkerEntry.h"
-#include "tests/core/conform/ConformFilm.h"
+#include "tests/support/core/ConformFilm.h"
 
 #include <gtest/gtest.h>
 

@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/core/conform/MemoryEngine.h"
+#include "tests/support/core/MemoryEngine.h"
 
 #include "core/cut/Cut.h"
 #include "core/settings/Settings.h"
-#include "tests/core/conform/ConformFilm.h"
-#include "tests/core/conform/RecordingProgress.h"
+#include "tests/support/core/ConformFilm.h"
+#include "tests/support/core/RecordingProgress.h"
 
 #include <gtest/gtest.h>
 

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/core/conform/MemoryTrack.h"
+#include "tests/support/core/MemoryTrack.h"
 
-#include "tests/core/ThrownResult.h"
+#include "tests/support/ThrownResult.h"
 
 #include <gtest/gtest.h>
 

@@ -2,8 +2,8 @@
 
 #include "core/conform/SnippetAlgorithm.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/cut/CutFilm.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/CutFilm.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -49,10 +49,10 @@ Times range(double srcIn, double srcOut, double dstIn)
 struct SnippetFilm : CutFilm {
     explicit SnippetFilm(const Framerate& rate = Framerate(25, 0)) : CutFilm(rate)
     {
-        settings.setIncludeOverhangingAudioEvents(true);
-        settings.setSnippetThreshold(5);
-        settings.setSnippetUsesPercentage(true);
-        settings.setSnippetMaxPercentage(50.0);
+        settings().setIncludeOverhangingAudioEvents(true);
+        settings().setSnippetThreshold(5);
+        settings().setSnippetUsesPercentage(true);
+        settings().setSnippetMaxPercentage(50.0);
     }
 
     double seconds(double frame) const { return (Hour + frame) / project.framerate.rate; }
@@ -253,10 +253,10 @@ TEST(SnippetAlgorithm, RateIsThatOfTheStateGiven)
     film.addCut({cutEvent(film.dialogue, {100.0, 200.0}, {1100.0, 1200.0})});
     const CutEventBase& found = *film.cuts.cutAt(0)->cutEvents()[0];
 
-    SnippetAlgorithm().process(film.cuts, {Framerate(25, 0), &film.settings});
+    SnippetAlgorithm().process(film.cuts, {Framerate(25, 0), &film.settings()});
     EXPECT_EQ(found.srcIn(), 100.0);
 
-    SnippetAlgorithm().process(film.cuts, {Framerate(24, 0), &film.settings});
+    SnippetAlgorithm().process(film.cuts, {Framerate(24, 0), &film.settings()});
     EXPECT_NEAR(found.srcIn(), 100.0 - 5.0 / 24.0, 1e-9);
 }
 
@@ -281,7 +281,7 @@ TEST(SnippetAlgorithm, PieceThatPassesTheThresholdByTheWholeToleranceDoesNotCoun
     // At one frame a second, from a clip at 0, the frames of a piece are the very float that its length is.
     const auto startAfter = [](double piece) {
         SnippetFilm film(Framerate(1, 0));
-        film.settings.setSnippetThreshold(0);
+        film.settings().setSnippetThreshold(0);
         addClip(film.dialogue, 0.0, 100.0);
         film.addCut({cutEvent(film.dialogue, {piece, 200.0}, {1000.0 + piece, 1200.0})});
         film.process();
@@ -341,7 +341,7 @@ TEST(SnippetAlgorithm, PieceOutsideTakesPrecedenceWhereBothAreShort)
     //  before    1000|-----------------------------|2000
     //  after  998|------------------------------------|2002
     atEveryRate([](SnippetFilm& film) {
-        film.settings.setSnippetUsesPercentage(false);
+        film.settings().setSnippetUsesPercentage(false);
         film.clip(998, 1002);
         film.clip(1998, 2002);
         film.carry(range(1000, 2000, 5000));
@@ -372,8 +372,8 @@ TEST(SnippetAlgorithm, PieceOfMoreThanItsShareOfTheClipDoesNotCountSoThatTheOthe
 TEST(SnippetAlgorithm, ShareOfTheClipDoesNotMatterWhenItIsNotAskedFor)
 {
     atEveryRate([](SnippetFilm& film) {
-        film.settings.setSnippetUsesPercentage(false);
-        film.settings.setSnippetMaxPercentage(0.0);
+        film.settings().setSnippetUsesPercentage(false);
+        film.settings().setSnippetMaxPercentage(0.0);
         film.clip(997, 1001);
         film.clip(1999, 2003);
         film.carry(range(1000, 2000, 5000));
@@ -390,8 +390,8 @@ TEST(SnippetAlgorithm, PieceOfExactlyItsShareOfTheClipCounts)
     // too much it is so for the piece inside as well.
     const auto startWithShare = [](double percent) {
         SnippetFilm film(Framerate(24, 0));
-        film.settings.setSnippetThreshold(48);
-        film.settings.setSnippetMaxPercentage(percent);
+        film.settings().setSnippetThreshold(48);
+        film.settings().setSnippetMaxPercentage(percent);
         addClip(film.dialogue, 98.0, 102.0);
         film.addCut({cutEvent(film.dialogue, {100.0, 200.0}, {1100.0, 1200.0})});
         film.process();
@@ -408,7 +408,7 @@ TEST(SnippetAlgorithm, ShareIsThatOfTheWholeClip)
     // 3 frames of 12 are 25 percent, wherever the range cuts the clip.
     for (const auto& [percent, moved] : {std::pair(24.9, 0), std::pair(25.1, 3)}) {
         SnippetFilm film;
-        film.settings.setSnippetMaxPercentage(percent);
+        film.settings().setSnippetMaxPercentage(percent);
         film.clip(997, 1009);
         film.clip(1991, 2003);
         film.carry(range(1000, 2000, 5000));
@@ -425,7 +425,7 @@ TEST(SnippetAlgorithm, ShortClipThatOnlyTouchesTheRangeComesAlongWholeWithoutASh
     //  before     1000|-----------------------|2000
     const auto film = [](bool usesPercentage) {
         auto made = std::make_unique<SnippetFilm>();
-        made->settings.setSnippetUsesPercentage(usesPercentage);
+        made->settings().setSnippetUsesPercentage(usesPercentage);
         made->clip(997, 1000);
         made->clip(2000, 2004);
         made->carry(range(1000, 2000, 5000));
@@ -441,7 +441,7 @@ TEST(SnippetAlgorithm, ThresholdOfZeroOrLessLetsNothingMove)
 {
     for (const std::int32_t threshold : {0, -1, std::numeric_limits<std::int32_t>::min()}) {
         SnippetFilm film;
-        film.settings.setSnippetThreshold(threshold);
+        film.settings().setSnippetThreshold(threshold);
         film.clip(999, 2001);
         film.carry(range(1000, 2000, 5000));
 
@@ -472,7 +472,7 @@ TEST(SnippetAlgorithm, RangeThatIsExactlyOneShortClipLosesItAtBothEnds)
     //  before   1000|---|1003
     //  after        |   1003 is the start, and 1000 the end
     SnippetFilm film;
-    film.settings.setSnippetUsesPercentage(false);
+    film.settings().setSnippetUsesPercentage(false);
     film.clip(1000, 1003);
     film.carry(range(1000, 1003, 5000));
 
@@ -484,7 +484,7 @@ TEST(SnippetAlgorithm, RangeThatIsExactlyOneShortClipLosesItAtBothEnds)
 TEST(SnippetAlgorithm, NothingMovesUnlessOverhangingEventsAreIncluded)
 {
     SnippetFilm film;
-    film.settings.setIncludeOverhangingAudioEvents(false);
+    film.settings().setIncludeOverhangingAudioEvents(false);
     film.clip(997, 2003);
     film.carry(range(1000, 2000, 5000));
     film.carry(range(10000, 10100, 6000));
@@ -533,7 +533,7 @@ TEST(SnippetAlgorithm, FailureOfATrackPassesThrough)
     film.addCut({std::make_shared<FailingCutEvent>()});
 
     EXPECT_EQ(thrownBy([&] { film.process(); }), Result::HostObjectMissing);
-    film.settings.setIncludeOverhangingAudioEvents(false);
+    film.settings().setIncludeOverhangingAudioEvents(false);
     EXPECT_EQ(thrownBy([&] { film.process(); }), Result::Ok);
 }
 
@@ -888,10 +888,10 @@ TEST(SnippetAlgorithm, RangeThatGaveWayMakesTheNextGiveWayToItsOwnGrowth)
 struct GridFilm : CutFilm {
     GridFilm() : CutFilm(Framerate(32, 0))
     {
-        settings.setIncludeOverhangingAudioEvents(true);
-        settings.setSnippetThreshold(*rc::gen::inRange(0, 8));
-        settings.setSnippetUsesPercentage(*rc::gen::arbitrary<bool>());
-        settings.setSnippetMaxPercentage(*rc::gen::inRange(0, 101));
+        settings().setIncludeOverhangingAudioEvents(true);
+        settings().setSnippetThreshold(*rc::gen::inRange(0, 8));
+        settings().setSnippetUsesPercentage(*rc::gen::arbitrary<bool>());
+        settings().setSnippetMaxPercentage(*rc::gen::inRange(0, 101));
         for (const wchar_t* name : {L"Dialogue", L"Music"}) {
             MemoryTrack& track = addTrack(name);
             double frame = 100;
@@ -907,7 +907,7 @@ struct GridFilm : CutFilm {
     void carry(double srcIn, double srcLength, double dstIn, double dstLength)
     {
         core::Cut::CutEvents cutEvents;
-        for (MemoryTrack& track : tracks) {
+        for (MemoryTrack& track : tracks()) {
             cutEvents.push_back(cutEvent(track, {srcIn / 32.0, (srcIn + srcLength) / 32.0},
                                          {dstIn / 32.0, (dstIn + dstLength) / 32.0}));
         }
@@ -940,9 +940,9 @@ RC_GTEST_PROP(SnippetAlgorithm, ChangesNothingWhereItIsNotAskedFor, (bool isOff)
     GridFilm film;
     film.carrySome(true);
     if (isOff)
-        film.settings.setIncludeOverhangingAudioEvents(false);
+        film.settings().setIncludeOverhangingAudioEvents(false);
     else
-        film.settings.setSnippetThreshold(0);
+        film.settings().setSnippetThreshold(0);
     const auto before = film.times();
 
     film.process();
@@ -989,14 +989,14 @@ RC_GTEST_PROP(SnippetAlgorithm, MovesAnEndOfASingleRangeOnlyToTheEdgeOfAClipWith
     for (std::size_t track = 0; track < after.size(); ++track) {
         std::vector<double> edges{before[track].srcIn, before[track].srcOut};
         bool isOneClip = false;
-        for (const MemoryClip& clip : film.tracks[track].clips()) {
+        for (const MemoryClip& clip : film.tracks()[track].clips()) {
             edges.insert(edges.end(), {clip.start * 32.0, clip.end * 32.0});
             isOneClip |= clip.start * 32.0 == before[track].srcIn && clip.end * 32.0 == before[track].srcOut;
         }
         RC_ASSERT(std::count(edges.begin(), edges.end(), after[track].srcIn) > 0);
         RC_ASSERT(std::count(edges.begin(), edges.end(), after[track].srcOut) > 0);
-        RC_ASSERT(std::abs(after[track].srcIn - before[track].srcIn) <= film.settings.snippetThreshold());
-        RC_ASSERT(std::abs(after[track].srcOut - before[track].srcOut) <= film.settings.snippetThreshold());
+        RC_ASSERT(std::abs(after[track].srcIn - before[track].srcIn) <= film.settings().snippetThreshold());
+        RC_ASSERT(std::abs(after[track].srcOut - before[track].srcOut) <= film.settings().snippetThreshold());
         RC_ASSERT(after[track].srcIn <= after[track].srcOut || isOneClip);
         RC_ASSERT(after[track].dstIn - before[track].dstIn == after[track].srcIn - before[track].srcIn);
     }

@@ -7,10 +7,9 @@
 #include "core/cut/Cut.h"
 #include "core/cut/MarkerEntry.h"
 #include "core/edl/EventBase.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/conform/MemoryTrack.h"
-#include "tests/core/edl/EventMaking.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/MemoryTrack.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -50,7 +49,6 @@ struct Film {
         return std::make_shared<Cut>(changeEvent(), std::move(cutEvents));
     }
 
-    TestProject project;
     MemoryTrack track{L"Dialogue"};
     CutList list;
 };

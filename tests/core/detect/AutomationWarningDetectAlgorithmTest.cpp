@@ -2,9 +2,9 @@
 
 #include "core/detect/AutomationWarningDetectAlgorithm.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/conform/RecordingProgress.h"
-#include "tests/core/cut/CutFilm.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/CutFilm.h"
+#include "tests/support/core/RecordingProgress.h"
 #include "util/StringUtil.h"
 
 #include <gtest/gtest.h>

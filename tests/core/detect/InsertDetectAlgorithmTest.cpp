@@ -2,9 +2,9 @@
 
 #include "core/detect/InsertDetectAlgorithm.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/conform/RecordingProgress.h"
-#include "tests/core/cut/CutFilm.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/CutFilm.h"
+#include "tests/support/core/RecordingProgress.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -34,7 +34,7 @@ struct InsertFilm : CutFilm {
     {
         auto event = makeEvent("A012", "10:00:00:00", "10:00:01:00", dstIn, dstOut);
         event->setClipName("SC 12 T3");
-        newEvents.add(event);
+        newEvents().add(event);
         return *event;
     }
     Entries detect(core::ProgressHandlerBase* progress = nullptr) const
@@ -136,7 +136,7 @@ TEST(InsertDetectAlgorithm, NewEventsAreLookedAtInTheOrderOfTheirList)
     InsertFilm film;
     film.addNew("01:00:40:00", "01:00:50:00");
     film.addNew("01:00:00:00", "01:00:10:00");
-    film.newEvents.add(film.newEvents.eventAt(0));
+    film.newEvents().add(film.newEvents().eventAt(0));
 
     const Entries expected{insertOfA012(3640.0, 3650.0), insertOfA012(3600.0, 3610.0), insertOfA012(3640.0, 3650.0)};
     EXPECT_EQ(film.detect(), expected);
@@ -145,7 +145,7 @@ TEST(InsertDetectAlgorithm, NewEventsAreLookedAtInTheOrderOfTheirList)
 TEST(InsertDetectAlgorithm, InsertIsNamedAfterTheRollWhenEventsMatchByRoll)
 {
     InsertFilm film;
-    film.settings.setMatchBy(0);
+    film.settings().setMatchBy(0);
     film.addNew("01:00:00:00", "01:00:10:00");
 
     EXPECT_EQ(film.detect().at(0).name, "Insert: A012");
@@ -157,7 +157,7 @@ TEST(InsertDetectAlgorithm, InsertIsNamedAfterTheClipWhenEventsMatchByAnythingEl
     film.addNew("01:00:00:00", "01:00:10:00");
 
     for (const std::int32_t matchBy : {1, 2, -1}) {
-        film.settings.setMatchBy(matchBy);
+        film.settings().setMatchBy(matchBy);
         EXPECT_EQ(film.detect().at(0).name, "Insert: SC 12 T3") << matchBy;
     }
 }
@@ -301,7 +301,7 @@ RC_GTEST_PROP(InsertDetectAlgorithm, InsertsAreTheLongestRunsOfFramesThatNoChang
     }
     const auto in = *rc::gen::inRange(0, 600);
     const auto out = in + *rc::gen::inRange(1, 600);
-    film.newEvents.add(eventAtFrames(in, out));
+    film.newEvents().add(eventAtFrames(in, out));
 
     Entries expected;
     for (std::int32_t frame = in; frame < out; ++frame) {

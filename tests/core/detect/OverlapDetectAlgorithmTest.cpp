@@ -2,9 +2,9 @@
 
 #include "core/detect/OverlapDetectAlgorithm.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/conform/RecordingProgress.h"
-#include "tests/core/cut/CutFilm.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/CutFilm.h"
+#include "tests/support/core/RecordingProgress.h"
 #include "util/StringUtil.h"
 
 #include <gtest/gtest.h>
@@ -151,7 +151,7 @@ TEST(OverlapDetectAlgorithm, TracksOfAPairShareOneEntryThatHoldsAllTheirOverlaps
     MemoryTrack& music = film.addTrack(L"Music");
     MemoryTrack& effects = film.addTrack(L"Effects");
     MemoryTrack& voices = film.addTrack(L"Voices");
-    for (MemoryTrack& track : film.tracks)
+    for (MemoryTrack& track : film.tracks())
         fill(track);
     film.addCut({cutEvent(film.dialogue, {100.0, 110.0}, {200.0, 210.0}),
                  cutEvent(music, {100.0, 111.0}, {200.0, 211.0}), cutEvent(effects, {100.0, 110.0}, {200.0, 210.0}),

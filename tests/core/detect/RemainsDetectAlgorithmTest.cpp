@@ -2,9 +2,9 @@
 
 #include "core/detect/RemainsDetectAlgorithm.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/conform/RecordingProgress.h"
-#include "tests/core/cut/CutFilm.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/CutFilm.h"
+#include "tests/support/core/RecordingProgress.h"
 #include "util/StringUtil.h"
 
 #include <gtest/gtest.h>
@@ -313,7 +313,7 @@ TEST(RemainsDetectAlgorithm, NameOfTheTrackIsWrittenInUtf8)
 TEST(RemainsDetectAlgorithm, ThresholdIsTheOneGivenAndNotThatOfTheSettings)
 {
     RemainsFilm film;
-    film.settings.setRemainsThreshold(0);
+    film.settings().setRemainsThreshold(0);
     addClip(film.dialogue, 90.0, 100.12);
     film.carryTenSeconds();
 

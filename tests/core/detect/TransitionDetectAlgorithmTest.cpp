@@ -2,9 +2,9 @@
 
 #include "core/detect/TransitionDetectAlgorithm.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/conform/RecordingProgress.h"
-#include "tests/core/cut/CutFilm.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/CutFilm.h"
+#include "tests/support/core/RecordingProgress.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -42,13 +42,13 @@ struct TransitionFilm : CutFilm {
     }
     EventBase& addOld(std::int32_t type, const char* dstIn, const char* dstOut)
     {
-        oldEvents.add(transition(type, dstIn, dstOut));
-        return oldEvents.at(oldEvents.size() - 1);
+        oldEvents().add(transition(type, dstIn, dstOut));
+        return oldEvents().at(oldEvents().size() - 1);
     }
     EventBase& addNew(std::int32_t type, const char* dstIn, const char* dstOut)
     {
-        newEvents.add(transition(type, dstIn, dstOut));
-        return newEvents.at(newEvents.size() - 1);
+        newEvents().add(transition(type, dstIn, dstOut));
+        return newEvents().at(newEvents().size() - 1);
     }
     Entries detect(core::ProgressHandlerBase* progress = nullptr) const
     {
@@ -236,10 +236,10 @@ TEST(TransitionDetectAlgorithm, MarkerIsNamedAfterTheClipUnlessEventsMatchByRoll
     TransitionFilm film;
     film.addNew(TransitionType::Dissolve, "01:00:10:00", "01:00:20:00");
 
-    film.settings.setMatchBy(0);
+    film.settings().setMatchBy(0);
     EXPECT_EQ(film.detect().at(0).name, "D 7 A012");
     for (const std::int32_t matchBy : {1, 2, -1}) {
-        film.settings.setMatchBy(matchBy);
+        film.settings().setMatchBy(matchBy);
         EXPECT_EQ(film.detect().at(0).name, "D 7 SC 12 T3") << matchBy;
     }
 }
@@ -268,7 +268,7 @@ TEST(TransitionDetectAlgorithm, DurationThatIsNoTimecodeIsOutOfRange)
     TransitionFilm wholeDay;
     wholeDay.addNew(TransitionType::Dissolve, "01:00:10:00", "01:00:20:00").setTransitionDuration(2160000);
     EXPECT_EQ(thrownBy([&] { wholeDay.detect(); }), Result::OutOfRange);
-    wholeDay.newEvents.at(0).setTransitionDuration(2159999);
+    wholeDay.newEvents().at(0).setTransitionDuration(2159999);
     EXPECT_EQ(wholeDay.detect().size(), 1U);
 }
 
@@ -371,9 +371,9 @@ RC_GTEST_PROP(TransitionDetectAlgorithm, MarksAllNewTransitionsWithoutAnOldPlace
 {
     TransitionFilm film;
     for (const auto& event : *rc::gen::container<std::vector<std::shared_ptr<EventBase>>>(anyTransition()))
-        film.oldEvents.add(event);
+        film.oldEvents().add(event);
     for (const auto& event : *rc::gen::container<std::vector<std::shared_ptr<EventBase>>>(anyTransition()))
-        film.newEvents.add(event);
+        film.newEvents().add(event);
     // Change events that touch, so that places meet their bounds from either side.
     std::int32_t frame = 0;
     for (const std::int32_t length : *rc::gen::container<std::vector<std::int32_t>>(rc::gen::inRange(5, 30))) {
@@ -385,14 +385,14 @@ RC_GTEST_PROP(TransitionDetectAlgorithm, MarksAllNewTransitionsWithoutAnOldPlace
         return event.transitionType() == 1 || event.transitionType() == 2;
     };
     Entries expected;
-    for (const auto& event : film.newEvents.events()) {
+    for (const auto& event : film.newEvents().events()) {
         const auto stoodThere = [&](const auto& old) {
             return isTransition(*old) && old->dstIn() == event->dstIn() && old->dstOut() == event->dstOut();
         };
         const auto holdsIt = [&](const auto& change) {
             return event->dstIn() >= change->dstIn() && change->dstOut() >= event->dstOut();
         };
-        const auto& old = film.oldEvents.events();
+        const auto& old = film.oldEvents().events();
         const auto& changes = film.cuts.events().events();
         if (!isTransition(*event) || std::any_of(old.begin(), old.end(), stoodThere) ||
             std::any_of(changes.begin(), changes.end(), holdsIt))

@@ -4,9 +4,9 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -79,10 +79,9 @@ Events inOrder(const std::vector<CutEntry>& entries)
 
 TEST(CutMap, AnEmptyListGivesAnEmptyMap)
 {
-    const TestProject project;
     const EventList list;
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_TRUE(map.dstInOrder().empty());
     EXPECT_TRUE(map.srcInOrder().empty());
@@ -94,12 +93,11 @@ TEST(CutMap, AnEmptyListGivesAnEmptyMap)
 
 TEST(CutMap, AListOfNothingButInvalidTimecodesGivesAnEmptyMap)
 {
-    const TestProject project;
     const Event event = makeEvent("A", "00:00:00:29", "00:00:10:00", "00:00:00:00", "00:00:10:00");
     ASSERT_TRUE(event->hasFlaw(core::EventFlaw::TimecodeInvalid));
     const EventList list = listOf({event});
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_TRUE(map.dstInOrder().empty());
     EXPECT_TRUE(map.srcInOrder().empty());
@@ -110,14 +108,13 @@ TEST(CutMap, AListOfNothingButInvalidTimecodesGivesAnEmptyMap)
 
 TEST(CutMap, EveryOtherFlawLeavesAnEventInTheMap)
 {
-    const TestProject project;
     const Event reversed = inProgramme(20, 10);
     const Event unreadable = inProgramme(10, 20);
     unreadable->addFlaw(core::EventFlaw::NotVideoEvent);
     const Event fresh = std::make_shared<EventBase>();
     const EventList list = listOf({reversed, unreadable, fresh});
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(inOrder(map.dstInOrder()), (Events{fresh, unreadable, reversed}));
     EXPECT_TRUE(map.contains(reversed));
@@ -127,12 +124,11 @@ TEST(CutMap, EveryOtherFlawLeavesAnEventInTheMap)
 
 TEST(CutMap, ContainsKnowsTheVeryEventAndNotItsLikes)
 {
-    const TestProject project;
     const Event event = inProgramme(10, 20);
     const Event twin = inProgramme(10, 20);
     const EventList list = listOf({event});
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_TRUE(map.contains(event));
     EXPECT_FALSE(map.contains(twin));
@@ -141,13 +137,12 @@ TEST(CutMap, ContainsKnowsTheVeryEventAndNotItsLikes)
 
 TEST(CutMap, EachSideIsSortedByItsOwnStart)
 {
-    const TestProject project;
     const Event a = makeEvent("A", "00:00:30:00", "00:00:31:00", "00:00:10:00", "00:00:11:00");
     const Event b = makeEvent("B", "00:00:10:00", "00:00:11:00", "00:00:20:00", "00:00:21:00");
     const Event c = makeEvent("C", "00:00:20:00", "00:00:21:00", "00:00:00:24", "00:00:02:00");
     const EventList list = listOf({a, b, c});
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(inOrder(map.dstInOrder()), (Events{c, a, b}));
     EXPECT_EQ(inOrder(map.srcInOrder()), (Events{b, c, a}));
@@ -157,13 +152,12 @@ TEST(CutMap, EachSideIsSortedByItsOwnStart)
 
 TEST(CutMap, EventsOfEqualStartStayInTheOrderOfTheList)
 {
-    const TestProject project;
     const Event first = inProgramme(10, 20);
     const Event second = inProgramme(10, 15);
     const Event earlier = inProgramme(5, 6);
     const EventList list = listOf({first, second, earlier});
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(inOrder(map.dstInOrder()), (Events{earlier, first, second}));
     EXPECT_EQ(inOrder(map.srcInOrder()), (Events{first, second, earlier}));
@@ -171,12 +165,11 @@ TEST(CutMap, EventsOfEqualStartStayInTheOrderOfTheList)
 
 TEST(CutMap, AnEventThatStandsTwiceInTheListStandsTwiceInItsOrders)
 {
-    const TestProject project;
     const Event twice = inProgramme(10, 20);
     const Event other = inProgramme(5, 6);
     const EventList list = listOf({twice, other, twice});
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(inOrder(map.dstInOrder()), (Events{other, twice, twice}));
     EXPECT_TRUE(map.contains(twice));
@@ -184,10 +177,9 @@ TEST(CutMap, AnEventThatStandsTwiceInTheListStandsTwiceInItsOrders)
 
 TEST(CutMap, TheMapDoesNotFollowTheList)
 {
-    const TestProject project;
     const Event event = inProgramme(10, 20);
     EventList list = listOf({event});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     list.clear();
     event->setDst(Timecode("00:01:00:00"), Timecode("00:02:00:00"));
@@ -199,10 +191,9 @@ TEST(CutMap, TheMapDoesNotFollowTheList)
 
 TEST(CutMap, TheMapKeepsItsEventsAlive)
 {
-    const TestProject project;
     EventList list;
     list.add(inProgramme(10, 20));
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     list.clear();
 
@@ -213,11 +204,10 @@ TEST(CutMap, TheMapKeepsItsEventsAlive)
 
 TEST(CutMap, SpansReachFromTheFirstToTheLastEdgeOfASide)
 {
-    const TestProject project;
     const EventList list = listOf({makeEvent("A", "00:00:05:00", "00:00:06:00", "00:00:10:00", "00:00:40:00"),
                                    makeEvent("B", "00:00:02:00", "00:00:03:00", "00:00:20:00", "00:00:30:00")});
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(map.sourceSpan(), (SecondsRange{2.0, 6.0}));
     EXPECT_EQ(map.destinationSpan(), (SecondsRange{10.0, 40.0}));
@@ -225,7 +215,6 @@ TEST(CutMap, SpansReachFromTheFirstToTheLastEdgeOfASide)
 
 TEST(CutMap, SecondsAreThoseOfTheGivenRate)
 {
-    const TestProject project(Framerate(25, 0));
     const EventList list = listOf({makeEvent("A", "00:00:00:12", "00:00:01:00", "00:00:00:06", "00:00:02:00")});
 
     const CutMap map(list, Framerate(24, 0));
@@ -244,21 +233,19 @@ TEST(CutMap, BuildingUnderARateThatTheTimecodesDoNotFitFails)
 
 TEST(CutMapEventsInRange, ARangeInsideAnEventAnswersThatEvent)
 {
-    const TestProject project;
     const Event event = inProgramme(0, 30);
     const EventList list = listOf({event});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(10.0, 20.0)), (Events{event}));
 }
 
 TEST(CutMapEventsInRange, BothBoundsBelongToTheRange)
 {
-    const TestProject project;
     const Event before = inProgramme(0, 10);
     const Event behind = inProgramme(20, 30);
     const EventList list = listOf({before, behind});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(10.0, 20.0)), (Events{before, behind}));
     EXPECT_TRUE(map.eventsInDestinationRange(10.04, 19.96).empty());
@@ -266,9 +253,8 @@ TEST(CutMapEventsInRange, BothBoundsBelongToTheRange)
 
 TEST(CutMapEventsInRange, AnEmptyOrReversedRangeAnswersNothing)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(0, 30), inProgramme(10, 20)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_TRUE(map.eventsInDestinationRange(10.0, 10.0).empty());
     EXPECT_TRUE(map.eventsInDestinationRange(15.0, 15.0).empty());
@@ -278,9 +264,8 @@ TEST(CutMapEventsInRange, AnEmptyOrReversedRangeAnswersNothing)
 
 TEST(CutMapEventsInRange, NoNumberAsABoundAnswersNothing)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(0, 30)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
     constexpr double NoNumber = std::numeric_limits<double>::quiet_NaN();
 
     EXPECT_TRUE(map.eventsInDestinationRange(NoNumber, 20.0).empty());
@@ -289,35 +274,32 @@ TEST(CutMapEventsInRange, NoNumberAsABoundAnswersNothing)
 
 TEST(CutMapEventsInRange, AnEventWithBothEdgesInTheRangeStandsOnce)
 {
-    const TestProject project;
     const Event a = inProgramme(10, 12);
     const Event b = inProgramme(14, 16);
     const EventList list = listOf({b, a});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(0.0, 100.0)), (Events{a, b}));
 }
 
 TEST(CutMapEventsInRange, AnEventInterleavedWithAnotherStandsTwice)
 {
-    const TestProject project;
     const Event a = inProgramme(10, 20);
     const Event b = inProgramme(15, 25);
     const EventList list = listOf({a, b});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(0.0, 100.0)), (Events{a, b, a, b}));
 }
 
 TEST(CutMapEventsInRange, EdgesAtOneInstantStandInTheOrderOfTheList)
 {
-    const TestProject project;
     const Event before = inProgramme(10, 20);
     const Event behind = inProgramme(20, 30);
     const EventList forward = listOf({before, behind});
     const EventList backward = listOf({behind, before});
-    const CutMap forwardMap(forward, project.framerate);
-    const CutMap backwardMap(backward, project.framerate);
+    const CutMap forwardMap(forward, Timecode::framerate());
+    const CutMap backwardMap(backward, Timecode::framerate());
 
     EXPECT_EQ(locked(forwardMap.eventsInDestinationRange(15.0, 25.0)), (Events{before, behind}));
     EXPECT_EQ(locked(backwardMap.eventsInDestinationRange(15.0, 25.0)), (Events{behind, before}));
@@ -325,9 +307,8 @@ TEST(CutMapEventsInRange, EdgesAtOneInstantStandInTheOrderOfTheList)
 
 TEST(CutMapEventsInRange, BetweenTheEdgesOfTwoDifferentEventsNothingIsAnswered)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(0, 30), inProgramme(5, 40)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     // The edges around the range are the second event's start and the first event's end.
     EXPECT_TRUE(map.eventsInDestinationRange(10.0, 20.0).empty());
@@ -335,22 +316,20 @@ TEST(CutMapEventsInRange, BetweenTheEdgesOfTwoDifferentEventsNothingIsAnswered)
 
 TEST(CutMapEventsInRange, OfNestedEventsOnlyTheInnermostIsAroundARange)
 {
-    const TestProject project;
     const Event outer = inProgramme(0, 30);
     const Event inner = inProgramme(5, 25);
     const EventList list = listOf({outer, inner});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(10.0, 20.0)), (Events{inner}));
 }
 
 TEST(CutMapEventsInRange, AnEventAroundTheRangeIsLeftOutWhenAnotherHasAnEdgeInIt)
 {
-    const TestProject project;
     const Event outer = inProgramme(0, 30);
     const Event inner = inProgramme(12, 18);
     const EventList list = listOf({outer, inner});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(10.0, 20.0)), (Events{inner}));
     EXPECT_EQ(map.uncoveredDestinationRanges({10.0, 20.0}), (Ranges{{10.0, 12.0}, {18.0, 20.0}}));
@@ -358,9 +337,8 @@ TEST(CutMapEventsInRange, AnEventAroundTheRangeIsLeftOutWhenAnotherHasAnEdgeInIt
 
 TEST(CutMapEventsInRange, OutsideAllEventsNothingIsAnswered)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(10, 20)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_TRUE(map.eventsInDestinationRange(0.0, 9.0).empty());
     EXPECT_TRUE(map.eventsInDestinationRange(21.0, 30.0).empty());
@@ -368,11 +346,10 @@ TEST(CutMapEventsInRange, OutsideAllEventsNothingIsAnswered)
 
 TEST(CutMapEventsInRange, TheSourceSideAnswersByItsOwnEdges)
 {
-    const TestProject project;
     const Event a = inSource(10, 20);
     const Event b = inSource(30, 60);
     const EventList list = listOf({b, a});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInSourceRange(5.0, 30.0)), (Events{a, b}));
     EXPECT_EQ(locked(map.eventsInSourceRange(40.0, 50.0)), (Events{b}));
@@ -381,10 +358,9 @@ TEST(CutMapEventsInRange, TheSourceSideAnswersByItsOwnEdges)
 
 TEST(CutMapUncoveredRanges, AnEventThatOnlyTouchesTheRangeCoversNothing)
 {
-    const TestProject project;
     const Event event = inProgramme(20, 30);
     const EventList list = listOf({event});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(10.0, 20.0)), (Events{event}));
     EXPECT_EQ(map.uncoveredDestinationRanges({10.0, 20.0}), (Ranges{{10.0, 20.0}}));
@@ -392,19 +368,17 @@ TEST(CutMapUncoveredRanges, AnEventThatOnlyTouchesTheRangeCoversNothing)
 
 TEST(CutMapUncoveredRanges, AnEventInTheMiddleLeavesAPieceOnEachSide)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(10, 20)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(map.uncoveredDestinationRanges({0.0, 30.0}), (Ranges{{0.0, 10.0}, {20.0, 30.0}}));
 }
 
 TEST(CutMapUncoveredRanges, AnEventOfNoLengthCoversNothingAndSplitsNothing)
 {
-    const TestProject project;
     const Event empty = inProgramme(10, 10);
     const EventList list = listOf({empty});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(locked(map.eventsInDestinationRange(0.0, 30.0)), (Events{empty}));
     EXPECT_EQ(map.uncoveredDestinationRanges({0.0, 30.0}), (Ranges{{0.0, 30.0}}));
@@ -412,9 +386,8 @@ TEST(CutMapUncoveredRanges, AnEventOfNoLengthCoversNothingAndSplitsNothing)
 
 TEST(CutMapUncoveredRanges, AnEventAcrossAnEdgeOfTheRangeLeavesTheRest)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(10, 20)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(map.uncoveredDestinationRanges({15.0, 30.0}), (Ranges{{20.0, 30.0}}));
     EXPECT_EQ(map.uncoveredDestinationRanges({0.0, 15.0}), (Ranges{{0.0, 10.0}}));
@@ -422,9 +395,8 @@ TEST(CutMapUncoveredRanges, AnEventAcrossAnEdgeOfTheRangeLeavesTheRest)
 
 TEST(CutMapUncoveredRanges, AnEventOverTheWholeRangeLeavesNothing)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(10, 20)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_TRUE(map.uncoveredDestinationRanges({10.0, 20.0}).empty());
     EXPECT_TRUE(map.uncoveredDestinationRanges({12.0, 18.0}).empty());
@@ -432,18 +404,16 @@ TEST(CutMapUncoveredRanges, AnEventOverTheWholeRangeLeavesNothing)
 
 TEST(CutMapUncoveredRanges, EachEventIsTakenFromWhatTheOthersLeft)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(40, 50), inProgramme(10, 20), inProgramme(15, 25)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(map.uncoveredDestinationRanges({0.0, 60.0}), (Ranges{{0.0, 10.0}, {25.0, 40.0}, {50.0, 60.0}}));
 }
 
 TEST(CutMapUncoveredRanges, AnEventThatEndsBeforeItStartsFails)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(20, 10)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(thrownBy([&] { map.uncoveredDestinationRanges({0.0, 30.0}); }), Result::InvalidArgument);
     EXPECT_EQ(map.uncoveredDestinationRanges({21.0, 30.0}), (Ranges{{21.0, 30.0}}));
@@ -451,32 +421,29 @@ TEST(CutMapUncoveredRanges, AnEventThatEndsBeforeItStartsFails)
 
 TEST(CutMapUncoveredRanges, AnEmptyRangeStaysAsItIs)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(0, 30)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(map.uncoveredDestinationRanges({10.0, 10.0}), (Ranges{{10.0, 10.0}}));
 }
 
 TEST(CutMapUncoveredRanges, TheSourceSideHasItsOwn)
 {
-    const TestProject project;
     const EventList list = listOf({inSource(10, 20)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_EQ(map.uncoveredSourceRanges({0.0, 30.0}), (Ranges{{0.0, 10.0}, {20.0, 30.0}}));
     EXPECT_EQ(map.uncoveredDestinationRanges({0.0, 1.0}), Ranges{});
 
     const EventList reversed = listOf({inSource(20, 10)});
-    const CutMap reversedMap(reversed, project.framerate);
+    const CutMap reversedMap(reversed, Timecode::framerate());
     EXPECT_EQ(thrownBy([&] { reversedMap.uncoveredSourceRanges({0.0, 30.0}); }), Result::InvalidArgument);
 }
 
 TEST(CutMapInsideAnEvent, ARangeUpToBothEdgesOfAnEventIsInsideIt)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(10, 20)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_TRUE(map.isDestinationRangeInsideAnEvent({10.0, 20.0}));
     EXPECT_TRUE(map.isDestinationRangeInsideAnEvent({12.0, 18.0}));
@@ -485,9 +452,8 @@ TEST(CutMapInsideAnEvent, ARangeUpToBothEdgesOfAnEventIsInsideIt)
 
 TEST(CutMapInsideAnEvent, ARangeThatReachesBeyondIsNotInside)
 {
-    const TestProject project;
     const EventList list = listOf({inProgramme(10, 20), inProgramme(20, 30)});
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     EXPECT_FALSE(map.isDestinationRangeInsideAnEvent({9.0, 15.0}));
     EXPECT_FALSE(map.isDestinationRangeInsideAnEvent({15.0, 25.0}));
@@ -508,7 +474,6 @@ bool liesWithin(double second, const std::vector<std::pair<int, int>>& ranges)
 // The middle of each whole second stands for the second.
 RC_GTEST_PROP(CutMapUncoveredRanges, WhatIsLeftOfASpanIsWhatNoEventCovers, ())
 {
-    const TestProject project;
     const auto starts = *rc::gen::container<std::vector<int>>(rc::gen::inRange(0, 40));
     std::vector<std::pair<int, int>> covered;
     EventList list;
@@ -517,7 +482,7 @@ RC_GTEST_PROP(CutMapUncoveredRanges, WhatIsLeftOfASpanIsWhatNoEventCovers, ())
         covered.emplace_back(start, end);
         list.add(inProgramme(start, end));
     }
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     // Every edge lies in the range, so that no event can be missed.
     const Ranges left = map.uncoveredDestinationRanges({0.0, 50.0});
@@ -538,12 +503,11 @@ RC_GTEST_PROP(CutMapUncoveredRanges, WhatIsLeftOfASpanIsWhatNoEventCovers, ())
 
 RC_GTEST_PROP(CutMap, TheOrderIsThatOfAStableSort, ())
 {
-    const TestProject project;
     EventList list;
     for (const int start : *rc::gen::container<std::vector<int>>(rc::gen::inRange(0, 10)))
         list.add(inProgramme(start, start + 1));
 
-    const CutMap map(list, project.framerate);
+    const CutMap map(list, Timecode::framerate());
 
     Events expected = list.events();
     std::stable_sort(expected.begin(), expected.end(),

@@ -3,11 +3,11 @@
 #include "core/edl/EventBase.h"
 
 #include "core/edl/HealedEvent.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/model/HexBytes.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/HexBytes.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -109,7 +109,6 @@ TEST(EventBase, IsCreatedByItsKind)
 
 TEST(EventBase, AssignmentCopiesAllButTheTextOfFlawOne)
 {
-    const TestProject project;
     const auto source = fullEvent();
     ASSERT_EQ(source->reservedText(), "RT");
     ASSERT_EQ(source->flawText(), "odd");
@@ -135,7 +134,6 @@ TEST(EventBase, AssignmentCopiesAllButTheTextOfFlawOne)
 
 TEST(EventBase, ACopyHasTheSameFieldsWithoutTheTextOfFlawOne)
 {
-    const TestProject project;
     const auto source = fullEvent();
 
     const EventBase copy(*source);
@@ -150,7 +148,6 @@ TEST(EventBase, ACopyHasTheSameFieldsWithoutTheTextOfFlawOne)
 
 TEST(EventBase, AssignmentKeepsTheTargetsOwnTextOfFlawOne)
 {
-    const TestProject project;
     const auto target = fullEvent();
 
     *target = EventBase();
@@ -171,7 +168,6 @@ TEST(EventBase, AssignmentCopiesTheKindAlone)
 
 TEST(EventBase, ACopiedNewEventKeepsFlawZeroUntilItsTimecodesAreLookedAt)
 {
-    const TestProject project;
     const EventBase fresh;
 
     EventBase copy(fresh);
@@ -196,7 +192,6 @@ TEST(EventBase, SelfAssignmentDoesNothing)
 
 TEST(EventBase, ACopyHasNoListenersAndAssignmentKeepsThoseOfTheTargetInSilence)
 {
-    const TestProject project;
     const auto source = doubleSpeedEvent();
     EventBase target;
     RecordingListener sourceListener;
@@ -217,7 +212,6 @@ TEST(EventBase, ACopyHasNoListenersAndAssignmentKeepsThoseOfTheTargetInSilence)
 
 TEST(EventBase, FourValidTimecodesLeaveNoFlaw)
 {
-    const TestProject project;
     EventBase event;
 
     event.setTimecodes(Timecode("00:00:01:00"), Timecode("00:00:02:00"), Timecode("01:00:00:00"),
@@ -229,7 +223,6 @@ TEST(EventBase, FourValidTimecodesLeaveNoFlaw)
 
 TEST(EventBase, FlawZeroGoesWithTheLastOfTheFourTimecodes)
 {
-    const TestProject project;
     EventBase event;
     const Timecode time("00:00:01:00");
 
@@ -245,7 +238,6 @@ TEST(EventBase, FlawZeroGoesWithTheLastOfTheFourTimecodes)
 
 TEST(EventBase, AllZeroTimecodesAreValid)
 {
-    const TestProject project;
     const auto event = makeEvent("A", "00:00:00:00", "00:00:00:00", "00:00:00:00", "00:00:00:00");
 
     EXPECT_TRUE(event->isValid());
@@ -253,7 +245,6 @@ TEST(EventBase, AllZeroTimecodesAreValid)
 
 TEST(EventBase, AReversedRangeOnEitherSideIsFlawTwelveAndAnEmptyOneIsNot)
 {
-    const TestProject project;
     const auto event = makeEvent("A", "00:00:10:00", "00:00:05:00", "00:00:20:00", "00:00:30:00");
     EXPECT_EQ(event->flaws(), Flaws{12});
 
@@ -269,7 +260,6 @@ TEST(EventBase, AReversedRangeOnEitherSideIsFlawTwelveAndAnEmptyOneIsNot)
 
 TEST(EventBase, SwappingItsOwnTimecodesRemovesFlawTwelve)
 {
-    const TestProject project;
     const auto event = makeEvent("A", "00:00:10:00", "00:00:05:00", "00:00:30:00", "00:00:20:00");
 
     event->setSrc(event->srcOut(), event->srcIn());
@@ -281,7 +271,6 @@ TEST(EventBase, SwappingItsOwnTimecodesRemovesFlawTwelve)
 
 TEST(EventBase, TakesItsOwnTimecodesInAnyPlace)
 {
-    const TestProject project;
     const auto event = makeEvent("A", "00:00:01:00", "00:00:02:00", "00:00:03:00", "00:00:04:00");
 
     event->setTimecodes(event->dstIn(), event->dstOut(), event->srcIn(), event->srcOut());
@@ -296,7 +285,6 @@ TEST(EventBase, TakesItsOwnTimecodesInAnyPlace)
 
 TEST(EventBase, AnInvalidTimecodeIsFlawElevenUntilItIsPutRight)
 {
-    const TestProject project;
     const auto event = makeEvent("A", "00:00:00:25", "00:00:05:00", "00:00:20:00", "00:00:30:00");
     EXPECT_EQ(event->flaws(), Flaws{11});
 
@@ -306,7 +294,6 @@ TEST(EventBase, AnInvalidTimecodeIsFlawElevenUntilItIsPutRight)
 
 TEST(EventBase, EachOfTheFourTimecodesCanBeTheInvalidOne)
 {
-    const TestProject project;
     const char* const good = "00:00:05:00";
     const char* const bad = "00:00:05:25";
 
@@ -318,7 +305,6 @@ TEST(EventBase, EachOfTheFourTimecodesCanBeTheInvalidOne)
 
 TEST(EventBase, FlawTwelveStaysAsItWasWhileATimecodeIsInvalid)
 {
-    const TestProject project;
     const auto reversed = makeEvent("A", "00:00:10:00", "00:00:05:00", "00:00:20:00", "00:00:30:00");
     const auto straight = makeEvent("A", "00:00:05:00", "00:00:10:00", "00:00:20:00", "00:00:30:00");
 
@@ -333,7 +319,6 @@ TEST(EventBase, FlawTwelveStaysAsItWasWhileATimecodeIsInvalid)
 
 TEST(EventBase, UnsetTimecodesAreFlawZeroBesideAnInvalidOne)
 {
-    const TestProject project;
     EventBase event;
 
     event.setSrcIn(Timecode("00:00:00:25"));
@@ -366,6 +351,7 @@ TEST(EventBase, RevalidatingUnderALowerRateFindsTheInvalidFrameAndKeepsTheRest)
 
 TEST(EventBase, SettingTimecodesNeedsAProviderAndMakingAnEventDoesNot)
 {
+    const NoProject none;
     EventBase event;
 
     EXPECT_EQ(thrownBy([&] { event.setSrcIn(Timecode("00:00:01:00")); }), Result::NotAvailable);
@@ -375,7 +361,6 @@ TEST(EventBase, SettingTimecodesNeedsAProviderAndMakingAnEventDoesNot)
 
 TEST(EventBase, FlawsAreASetInAscendingOrder)
 {
-    const TestProject project;
     const auto event = doubleSpeedEvent();
 
     event->addFlaw(EventFlaw::DstOutUnreadable);
@@ -394,7 +379,6 @@ TEST(EventBase, FlawsAreASetInAscendingOrder)
 
 TEST(EventBase, FlawsOfTheReaderOutliveAChangeOfTheTimecodes)
 {
-    const TestProject project;
     EventBase event;
     for (std::int32_t flaw = 1; flaw <= 10; ++flaw)
         event.addFlaw(flaw);
@@ -406,7 +390,6 @@ TEST(EventBase, FlawsOfTheReaderOutliveAChangeOfTheTimecodes)
 
 TEST(EventBase, OnlyTheFlawsOneToTenAreFormatFlaws)
 {
-    const TestProject project;
     for (std::int32_t flaw = 0; flaw <= 12; ++flaw) {
         const auto event = doubleSpeedEvent();
         event->addFlaw(flaw);
@@ -417,7 +400,6 @@ TEST(EventBase, OnlyTheFlawsOneToTenAreFormatFlaws)
 
 RC_GTEST_PROP(EventBase, AnEventOfValidTimecodesHasFlawTwelveExactlyWhenARangeIsReversed, ())
 {
-    const TestProject project;
     const auto frame = rc::gen::inRange<std::int32_t>(0, 2160000);
     const Timecode srcIn(*frame);
     const Timecode srcOut(*frame);
@@ -455,7 +437,6 @@ TEST(EventFlaw, HasNoMessageOutsideTheTable)
 
 TEST(EventBase, EachFlawHasItsMessageInALineOfItsOwn)
 {
-    const TestProject project;
     for (const auto& [flaw, message] : FlawMessages) {
         const auto event = doubleSpeedEvent();
         event->addFlaw(flaw);
@@ -465,14 +446,11 @@ TEST(EventBase, EachFlawHasItsMessageInALineOfItsOwn)
 
 TEST(EventBase, AnEventWithoutFlawsHasNoFlawsText)
 {
-    const TestProject project;
-
     EXPECT_EQ(doubleSpeedEvent()->flawsText(), "");
 }
 
 TEST(EventBase, AnEmptyLineFollowsTheMessageOfFlawZero)
 {
-    const TestProject project;
     EventBase event;
     event.addFlaw(EventFlaw::NotVideoEvent);
 
@@ -481,7 +459,6 @@ TEST(EventBase, AnEmptyLineFollowsTheMessageOfFlawZero)
 
 TEST(EventBase, MessagesComeInAscendingOrder)
 {
-    const TestProject project;
     EventBase event;
     std::string expected;
     for (const auto& [flaw, message] : FlawMessages) {
@@ -494,7 +471,6 @@ TEST(EventBase, MessagesComeInAscendingOrder)
 
 TEST(EventBase, TheFreeTextIsShownInItsPlaceWhetherOrNotFlawOneIsSet)
 {
-    const TestProject project;
     const auto event = fullEvent();
     ASSERT_EQ(event->flaws(), Flaws{1});
     EXPECT_EQ(event->flawsText(), "odd\n");
@@ -511,7 +487,6 @@ TEST(EventBase, TheFreeTextIsShownInItsPlaceWhetherOrNotFlawOneIsSet)
 
 TEST(EventBase, AFlawOneWithoutATextAddsNothing)
 {
-    const TestProject project;
     const auto event = doubleSpeedEvent();
     event->addFlaw(1);
 
@@ -528,7 +503,6 @@ public:
 
 TEST(EventBase, MessagesAreTranslated)
 {
-    const TestProject project;
     const GermanConverter converter;
     util::StringUtil::setConverter(&converter);
     const auto event = doubleSpeedEvent();
@@ -539,7 +513,6 @@ TEST(EventBase, MessagesAreTranslated)
 
 TEST(EventBase, MessagesNeedAConverter)
 {
-    const TestProject project;
     util::StringUtil::setConverter(nullptr);
     const EventBase event;
 
@@ -548,8 +521,6 @@ TEST(EventBase, MessagesNeedAConverter)
 
 TEST(EventBase, MotionSpeedIsSourceOverDestination)
 {
-    const TestProject project;
-
     EXPECT_EQ(speedOf(50, 50), 1.0);
     EXPECT_EQ(speedOf(50, 25), 2.0);
     EXPECT_EQ(speedOf(25, 50), 0.5);
@@ -558,24 +529,18 @@ TEST(EventBase, MotionSpeedIsSourceOverDestination)
 
 TEST(EventBase, AFreezeFrameHasSpeedZeroAndAnEmptyEventSpeedOne)
 {
-    const TestProject project;
-
     EXPECT_EQ(speedOf(0, 50), 0.0);
     EXPECT_EQ(speedOf(0, 0), 1.0);
 }
 
 TEST(EventBase, AnEmptyDestinationCountsAsOneFrame)
 {
-    const TestProject project;
-
     // Two seconds of 25 frames over one frame.
     EXPECT_DOUBLE_EQ(speedOf(50, 0), 50.0);
 }
 
 TEST(EventBase, AReversedRangeHasANegativeSpeedAndRaisesNothing)
 {
-    const TestProject project;
-
     EXPECT_EQ(speedOf(-50, 50), -1.0);
     EXPECT_EQ(speedOf(50, -25), -2.0);
     EXPECT_EQ(speedOf(-50, -50), 1.0);
@@ -584,7 +549,6 @@ TEST(EventBase, AReversedRangeHasANegativeSpeedAndRaisesNothing)
 
 TEST(EventBase, MotionSpeedStaysWhileATimecodeIsInvalid)
 {
-    const TestProject project;
     const auto event = doubleSpeedEvent();
 
     event->setSrcOut(Timecode("00:00:10:25"));
@@ -641,7 +605,6 @@ RC_GTEST_PROP(EventBase, MotionSpeedDoesNotDependOnWhereTheEventStands, ())
 
 TEST(EventBase, ASpeedIsNormalWhenItIsCloserThanAHundredthToOne)
 {
-    const TestProject project;
     EventBase exactlyAboveByAHundredth;
     exactlyAboveByAHundredth.setTimecodes(Timecode(0), Timecode(101), Timecode(0), Timecode(100));
     EventBase above;
@@ -661,7 +624,6 @@ TEST(EventBase, ASpeedIsNormalWhenItIsCloserThanAHundredthToOne)
 
 TEST(EventBase, HasASpeedThatIsCloserThanAHundredth)
 {
-    const TestProject project;
     const auto event = doubleSpeedEvent();
 
     EXPECT_TRUE(event->hasSpeed(2.0));
@@ -674,7 +636,6 @@ TEST(EventBase, HasASpeedThatIsCloserThanAHundredth)
 
 TEST(EventBase, EachSetterStoresItsFields)
 {
-    const TestProject project;
     EventBase event;
 
     event.setRollName("A001");
@@ -703,7 +664,6 @@ TEST(EventBase, EachSetterStoresItsFields)
 
 TEST(EventBase, TheCombinedSettersStoreTheirTimecodes)
 {
-    const TestProject project;
     const auto event = makeEvent("A", "00:00:00:00", "00:00:00:00", "00:00:00:00", "00:00:00:00");
 
     event->setSrc(Timecode("00:00:00:01"), Timecode("00:00:00:02"));
@@ -719,7 +679,6 @@ TEST(EventBase, TheCombinedSettersStoreTheirTimecodes)
 
 TEST(EventBase, EachSetterNotifiesOnceBehindTheChange)
 {
-    const TestProject project;
     const Timecode one("00:00:00:01");
     const Timecode two("00:00:00:02");
     struct Setter {
@@ -814,7 +773,6 @@ TEST(EventBase, SendsTheOneContextThatItOwns)
 
 TEST(EventBase, HasTheSameTimecodesWhenAllFourAreEqual)
 {
-    const TestProject project;
     const auto event = makeEvent("A", "00:00:01:00", "00:00:02:00", "00:00:03:00", "00:00:04:00", 1);
 
     const auto same = makeEvent("B", "00:00:01:00", "00:00:02:00", "00:00:03:00", "00:00:04:00", 2);

@@ -4,10 +4,10 @@
 
 #include "core/edl/HealedEvent.h"
 #include "core/serialize/ByteArchive.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -126,7 +126,6 @@ TEST_F(ThreeEvents, AreContainedAsTheVeryObjects)
 
 TEST(EventList, CountsFlawedEvents)
 {
-    const TestProject project;
     const auto good = playing("00:00:00:00", "00:00:01:00");
     const auto reversed = playing("00:00:02:00", "00:00:01:00");
     const auto badFrame = playing("00:00:00:00", "00:00:00:25");
@@ -204,7 +203,6 @@ TEST_F(ThreeEvents, MoveTheListeningWhenTheyAreReplacedByAssignment)
 
 TEST_F(ThreeEvents, MayBeReplacedByTheMembersOfAHealedEventThatTheListAloneHolds)
 {
-    const TestProject project;
     const auto first = playing("00:00:01:00", "00:00:02:00");
     const auto second = playing("00:00:02:00", "00:00:03:00");
     auto holder = std::make_shared<HealedEvent>();
@@ -592,7 +590,6 @@ TEST_F(ThreeEvents, BecomeTheirOwnCopiesWhenTheListIsCopiedFromItself)
 
 TEST(EventList, TheCopyOfAHealedEventKeepsItsKindAndLosesItsMembers)
 {
-    const TestProject project;
     const auto healed = std::make_shared<HealedEvent>();
     healed->addEvent(playing("00:00:00:00", "00:00:01:00"));
     EventList list;
@@ -607,7 +604,6 @@ TEST(EventList, TheCopyOfAHealedEventKeepsItsKindAndLosesItsMembers)
 
 TEST(EventList, TheRangeGoesFromTheEarliestStartToTheLatestEndOnEachSide)
 {
-    const TestProject project;
     const EventList list = listOf({makeEvent("A", "00:00:30:00", "00:00:40:00", "01:00:10:00", "01:00:20:00"),
                                    makeEvent("A", "00:00:10:00", "00:00:50:00", "01:00:05:00", "01:00:45:00"),
                                    makeEvent("A", "00:00:20:00", "00:00:21:00", "01:00:50:00", "01:00:51:00")});
@@ -623,7 +619,6 @@ TEST(EventList, TheRangeGoesFromTheEarliestStartToTheLatestEndOnEachSide)
 
 TEST(EventList, AnInvalidEventDoesNotCountForTheRange)
 {
-    const TestProject project;
     const auto notVideo = playing("00:00:01:00", "00:00:50:00");
     notVideo->addFlaw(4);
     const EventList list =
@@ -635,7 +630,6 @@ TEST(EventList, AnInvalidEventDoesNotCountForTheRange)
 
 TEST(EventList, WithInvalidEventsAloneTheRangeIsEmptyAtZero)
 {
-    const TestProject project;
     const EventList list = listOf({playing("00:00:20:00", "00:00:10:00"), named("A")});
 
     for (const TimecodeRange& range : {list.sourceRange(), list.destinationRange()}) {
@@ -647,8 +641,6 @@ TEST(EventList, WithInvalidEventsAloneTheRangeIsEmptyAtZero)
 
 TEST(EventList, TheRangeReachesTheEndsOfTheDay)
 {
-    const TestProject project;
-
     const TimecodeRange last = listOf({playing("23:59:59:24", "23:59:59:24")}).destinationRange();
     const TimecodeRange first = listOf({playing("00:00:00:00", "00:00:00:00")}).destinationRange();
     const TimecodeRange day = listOf({playing("00:00:00:00", "23:59:59:24")}).destinationRange();
@@ -663,15 +655,12 @@ TEST(EventList, TheRangeReachesTheEndsOfTheDay)
 
 TEST(EventList, AnEmptyListHasNoRange)
 {
-    const TestProject project;
-
     EXPECT_EQ(thrownBy([] { EventList().sourceRange(); }), Result::NotAvailable);
     EXPECT_EQ(thrownBy([] { EventList().destinationRange(); }), Result::NotAvailable);
 }
 
 TEST(EventList, ShiftingTheDestinationMovesBothEndsOfItsEventsAndLeavesTheSource)
 {
-    const TestProject project;
     EventList list(core::ListKind::Old);
     fill(list, {playing("00:00:10:00", "00:00:11:00"), playing("00:00:20:00", "00:00:22:00")});
     RecordingListener listener;
@@ -691,7 +680,6 @@ TEST(EventList, ShiftingTheDestinationMovesBothEndsOfItsEventsAndLeavesTheSource
 
 TEST(EventList, ShiftingTheSourceLeavesTheDestination)
 {
-    const TestProject project;
     EventList list = listOf({makeEvent("A", "01:00:00:00", "01:00:01:00", "00:00:10:00", "00:00:11:00")});
 
     list.shiftSource(Timecode("00:30:00:00"), true);
@@ -703,7 +691,6 @@ TEST(EventList, ShiftingTheSourceLeavesTheDestination)
 
 TEST(EventList, ShiftsBackwardByExactlyTheFirstStartAndNotByAFrameMore)
 {
-    const TestProject project;
     EventList list = listOf({playing("00:00:20:00", "00:00:21:00"), playing("00:00:10:00", "00:00:11:00")});
     RecordingListener listener;
     list.addListener(&listener);
@@ -720,7 +707,6 @@ TEST(EventList, ShiftsBackwardByExactlyTheFirstStartAndNotByAFrameMore)
 
 TEST(EventList, ShiftsForwardUpToTheLastFrameOfTheDayAndNotByAFrameMore)
 {
-    const TestProject project;
     EventList list = listOf({playing("23:00:00:00", "23:59:59:20"), playing("22:00:00:00", "22:00:01:00")});
 
     EXPECT_EQ(thrownBy([&] { list.shiftDestination(Timecode("00:00:00:05"), true); }), Result::OutOfRange);
@@ -744,7 +730,6 @@ TEST(EventList, ShiftingCountsDropFramesAsFrames)
 
 TEST(EventList, InvalidEventsStayWhereTheyAreInAShift)
 {
-    const TestProject project;
     const auto notVideo = playing("00:00:05:00", "00:00:06:00");
     notVideo->addFlaw(4);
     EventList list = listOf({notVideo, playing("00:00:20:00", "00:00:21:00")});
@@ -757,7 +742,6 @@ TEST(EventList, InvalidEventsStayWhereTheyAreInAShift)
 
 TEST(EventList, ShiftingAnEmptyListDoesNothing)
 {
-    const TestProject project;
     EventList list;
 
     EXPECT_EQ(thrownBy([&] { list.shiftSource(Timecode("23:00:00:00"), false); }), Result::Ok);
@@ -792,7 +776,6 @@ TEST(EventList, AShiftThatFailsHalfwayKeepsWhatItMovedAndLeavesTheListDeaf)
 
 TEST_F(ThreeEvents, AreGoneAndNothingIsHeardAfterAReadingThatBreaksOff)
 {
-    const TestProject project;
     core::serialize::ByteArchive whole;
     whole << listOf({playing("00:00:01:00", "00:00:02:00"), playing("00:00:02:00", "00:00:03:00")});
     core::serialize::ByteArchive brokenOff;
@@ -809,7 +792,6 @@ TEST_F(ThreeEvents, AreGoneAndNothingIsHeardAfterAReadingThatBreaksOff)
 
 TEST(EventList, HearsItsEventsAfterAShift)
 {
-    const TestProject project;
     EventList list = listOf({playing("00:00:10:00", "00:00:11:00")});
     list.shiftDestination(Timecode("00:00:01:00"), true);
     RecordingListener listener;
@@ -844,7 +826,6 @@ RC_GTEST_PROP(EventList, AShiftMovesEachEventByTheFramesOfItsOffset, ())
 
 class Merging : public testing::Test {
 protected:
-    TestProject project;
     const std::shared_ptr<EventBase> one = playing("00:00:01:00", "00:00:02:00");
     const std::shared_ptr<EventBase> two = playing("00:00:02:00", "00:00:03:00");
     const std::shared_ptr<EventBase> three = playing("00:00:03:00", "00:00:04:00");
@@ -964,7 +945,6 @@ Events mergedByScanning(Events own, const Events& others)
 
 RC_GTEST_PROP(EventList, MergingGivesWhatAScanGives, ())
 {
-    const TestProject project;
     const auto makeEvents = [] {
         Events events;
         const auto places = *rc::gen::container<std::vector<int>>(rc::gen::inRange(0, 4));

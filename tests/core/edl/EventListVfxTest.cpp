@@ -5,9 +5,8 @@
 #include "core/settings/Settings.h"
 #include "core/settings/VfxNameMatcher.h"
 
-#include "tests/core/TestProject.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/RecordingListener.h"
 
 #include <gtest/gtest.h>
 
@@ -21,7 +20,6 @@ using cadrel::core::MatchBy;
 using cadrel::core::VfxNameMatcher;
 using cadrel::tests::makeEvent;
 using cadrel::tests::RecordingListener;
-using cadrel::tests::TestProject;
 
 using Kinds = std::vector<std::int32_t>;
 
@@ -53,7 +51,6 @@ protected:
         return flags;
     }
 
-    TestProject project;
     VfxNameMatcher patterns;
     EventList list{ListKind::New};
     RecordingListener listener;

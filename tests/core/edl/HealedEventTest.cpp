@@ -2,9 +2,8 @@
 
 #include "core/edl/HealedEvent.h"
 
-#include "tests/core/TestProject.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/RecordingListener.h"
 
 #include <gtest/gtest.h>
 
@@ -34,7 +33,6 @@ TEST(HealedEvent, ANewOneIsOfKindOneAndHasNoMembers)
 
 TEST(HealedEvent, TakesTheTimecodesOfItsFirstMember)
 {
-    const TestProject project;
     const auto member = makeEvent("A", "00:00:01:00", "00:00:03:00", "00:00:04:00", "00:00:05:00");
     HealedEvent healed;
 
@@ -49,7 +47,6 @@ TEST(HealedEvent, TakesTheTimecodesOfItsFirstMember)
 
 TEST(HealedEvent, TakesAMemberByReferenceToItsOwnPlace)
 {
-    const TestProject project;
     const auto member = makeEvent("A", "00:00:01:00", "00:00:03:00", "00:00:04:00", "00:00:05:00");
     HealedEvent healed;
     healed.addEvent(member);
@@ -64,7 +61,6 @@ TEST(HealedEvent, TakesAMemberByReferenceToItsOwnPlace)
 
 TEST(HealedEvent, SpansItsMembersAndTheGapBetweenThem)
 {
-    const TestProject project;
     HealedEvent healed;
 
     healed.addEvent(makeEvent("A", "00:01:10:00", "00:01:20:00", "00:00:10:00", "00:00:20:00"));
@@ -76,7 +72,6 @@ TEST(HealedEvent, SpansItsMembersAndTheGapBetweenThem)
 
 TEST(HealedEvent, WidensEachOfItsFourEndsByItself)
 {
-    const TestProject project;
     HealedEvent healed;
 
     healed.addEvent(makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:30:00", "00:00:40:00"));
@@ -90,7 +85,6 @@ TEST(HealedEvent, WidensEachOfItsFourEndsByItself)
 
 TEST(HealedEvent, IsAVfxShotWhenAnyMemberIs)
 {
-    const TestProject project;
     const auto plain = makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:10:00", "00:00:20:00");
     const auto shot = makeEvent("A", "00:00:30:00", "00:00:40:00", "00:00:30:00", "00:00:40:00");
     shot->setVfx(true);
@@ -111,7 +105,6 @@ TEST(HealedEvent, IsAVfxShotWhenAnyMemberIs)
 
 TEST(HealedEvent, LooksAtItsFlawsAnewWithEachMember)
 {
-    const TestProject project;
     HealedEvent healed;
 
     healed.addEvent(makeEvent("A", "00:00:20:00", "00:00:10:00", "00:00:10:00", "00:00:20:00"));
@@ -126,7 +119,6 @@ TEST(HealedEvent, LooksAtItsFlawsAnewWithEachMember)
 
 TEST(HealedEvent, AddingAMemberIsAChangeOfTheInnerListAlone)
 {
-    const TestProject project;
     HealedEvent healed;
     RecordingListener ofEvent;
     RecordingListener ofMembers;
@@ -144,7 +136,6 @@ TEST(HealedEvent, AddingAMemberIsAChangeOfTheInnerListAlone)
 
 TEST(HealedEvent, ItsInnerListHearsItsMembers)
 {
-    const TestProject project;
     HealedEvent healed;
     const auto member = makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:10:00", "00:00:20:00");
     healed.addEvent(member);
@@ -158,7 +149,6 @@ TEST(HealedEvent, ItsInnerListHearsItsMembers)
 
 TEST(HealedEvent, AMemberThatChangesLaterDoesNotMoveIt)
 {
-    const TestProject project;
     HealedEvent healed;
     const auto member = makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:10:00", "00:00:20:00");
     healed.addEvent(member);
@@ -170,7 +160,6 @@ TEST(HealedEvent, AMemberThatChangesLaterDoesNotMoveIt)
 
 TEST(HealedEvent, ACopySharesTheMembersAndHasNoListeners)
 {
-    const TestProject project;
     HealedEvent healed;
     healed.addEvent(makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:10:00", "00:00:20:00"));
     healed.setRollName("Healed Event 001");
@@ -219,7 +208,6 @@ int depthOf(const HealedEvent& healed)
 
 TEST(HealedEvent, ALongChainGoesWithoutRecursion)
 {
-    const TestProject project;
     auto chain = longChain();
     ASSERT_EQ(depthOf(*chain), LongChain);
     const std::weak_ptr<HealedEvent> watch = chain;
@@ -231,7 +219,6 @@ TEST(HealedEvent, ALongChainGoesWithoutRecursion)
 
 TEST(HealedEvent, ALongChainGoesFromItsListWithoutRecursion)
 {
-    const TestProject project;
     core::EventList list;
     std::weak_ptr<EventBase> innermost;
     {
@@ -251,7 +238,6 @@ TEST(HealedEvent, ALongChainGoesFromItsListWithoutRecursion)
 
 TEST(HealedEvent, TheMembersOfALongChainGoWithoutRecursion)
 {
-    const TestProject project;
     const auto chain = longChain();
 
     chain->healedEvents().clear();
@@ -261,7 +247,6 @@ TEST(HealedEvent, TheMembersOfALongChainGoWithoutRecursion)
 
 TEST(HealedEvent, WhatSomeoneElseHoldsOfALongChainStaysWhole)
 {
-    const TestProject project;
     std::shared_ptr<HealedEvent> middle;
     auto chain = longChain(&middle);
 
@@ -273,7 +258,6 @@ TEST(HealedEvent, WhatSomeoneElseHoldsOfALongChainStaysWhole)
 
 TEST(HealedEvent, AMemberThatTwoHealedEventsShareOutlivesTheFirstOfThem)
 {
-    const TestProject project;
     const auto shared = std::make_shared<HealedEvent>();
     const auto member = makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:10:00", "00:00:20:00");
     shared->addEvent(member);

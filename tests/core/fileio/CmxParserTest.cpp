@@ -4,11 +4,11 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/fileio/EdlReading.h"
-#include "tests/core/notify/RecordingListener.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/core/EdlReading.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
@@ -84,8 +84,6 @@ std::string cutWithFrames(const std::string& frames)
 
 TEST(CmxParser, ReadsNoEventsFromAnEmptyFile)
 {
-    const TestProject project;
-
     const EdlReading reading("");
 
     EXPECT_EQ(reading.result, Result::Ok);
@@ -95,8 +93,6 @@ TEST(CmxParser, ReadsNoEventsFromAnEmptyFile)
 
 TEST(CmxParser, ReadsNoEventsFromATitleAndAFrameCountMode)
 {
-    const TestProject project;
-
     const EdlReading reading("TITLE: REEL 1\nFCM: NON-DROP FRAME\n");
 
     EXPECT_EQ(reading.result, Result::Ok);
@@ -106,8 +102,6 @@ TEST(CmxParser, ReadsNoEventsFromATitleAndAFrameCountMode)
 
 TEST(CmxParser, ReadsAllFieldsOfACut)
 {
-    const TestProject project;
-
     const OnlyEvent event("017  A001_C.3-x V     C        1:2:3:4 01:02:05:24 02:00:00:00 02:00:05:00");
 
     EXPECT_EQ(event->eventKind(), core::EventKind::Plain);
@@ -124,7 +118,6 @@ TEST(CmxParser, ReadsAllFieldsOfACut)
 
 TEST(CmxParser, AddsTheEventsBehindThosePresentInTheOrderOfTheFile)
 {
-    const TestProject project;
     const TempFolder folder;
     const auto path = folder.write("reel.edl", "007 AX V C " + Timecodes + "\n003 AX V C " + Timecodes + "\n");
     EventList events;
@@ -141,7 +134,6 @@ TEST(CmxParser, AddsTheEventsBehindThosePresentInTheOrderOfTheFile)
 
 TEST(CmxParser, MakesTheListListenToItsNewEvents)
 {
-    const TestProject project;
     EdlReading reading(Cut);
     RecordingListener listener;
     reading.events.addListener(&listener);
@@ -154,8 +146,6 @@ TEST(CmxParser, MakesTheListListenToItsNewEvents)
 
 TEST(CmxParser, TakesAnyLineThatOpensWithADigitForAnEvent)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent("2 AX V C " + Timecodes)->eventNumber(), 2U);
     EXPECT_EQ(OnlyEvent("000042 AX V C " + Timecodes)->eventNumber(), 42U);
     EXPECT_EQ(OnlyEvent(" \t7 AX V C " + Timecodes + " \t")->comment(), "7 AX V C " + Timecodes);
@@ -163,21 +153,16 @@ TEST(CmxParser, TakesAnyLineThatOpensWithADigitForAnEvent)
 
 TEST(CmxParser, SkipsEveryOtherLine)
 {
-    const TestProject project;
-
     EXPECT_EQ(countOf("TITLE: 1\nM2 AX 024.0 01:00:00:00\n# " + Cut + "\n>>>" + Cut + "\n-" + Cut + "\nfcm\n"), 0U);
 }
 
 TEST(CmxParser, IgnoresPiecesBehindTheLastField)
 {
-    const TestProject project;
-
     EXPECT_TRUE(OnlyEvent(Cut + " 00:00:00:00 anything")->isValid());
 }
 
 TEST(CmxParser, ReadsTheSameEventsFromFilesOfAnyDelimiter)
 {
-    const TestProject project;
     const std::string lineFeeds = "TITLE: X\n\nFCM: NON-DROP FRAME\n" + Cut + "\n* FROM CLIP NAME: A 1\n\n002 BX V C " +
                                   Timecodes + "\n* TO CLIP NAME: B";
 
@@ -200,8 +185,6 @@ TEST(CmxParser, ReadsTheSameEventsFromFilesOfAnyDelimiter)
 
 TEST(CmxParser, CutsAtCarriageReturnsWhereOneComesBeforeTheFirstLineFeed)
 {
-    const TestProject project;
-
     // The line feed is then no more than a character of the line, and here of its last timecode.
     const OnlyEvent event("TITLE: X\r" + Cut + "\n002 AX V C");
 
@@ -211,8 +194,6 @@ TEST(CmxParser, CutsAtCarriageReturnsWhereOneComesBeforeTheFirstLineFeed)
 
 TEST(CmxParser, CutsAtLineFeedsWhereOneComesBeforeTheFirstCarriageReturn)
 {
-    const TestProject project;
-
     const EdlReading reading("TITLE: X\n" + Cut + "\r\n002 AX V C " + Timecodes + "\r003 AX V C " + Timecodes);
 
     ASSERT_EQ(reading.events.size(), 2U);
@@ -222,8 +203,6 @@ TEST(CmxParser, CutsAtLineFeedsWhereOneComesBeforeTheFirstCarriageReturn)
 
 TEST(CmxParser, ReadsALastLineWithoutADelimiter)
 {
-    const TestProject project;
-
     EXPECT_EQ(countOf("TITLE: X\n" + Cut), 1U);
     EXPECT_EQ(countOf("TITLE: X\r\n" + Cut), 1U);
     EXPECT_EQ(countOf(Cut), 1U);
@@ -231,7 +210,6 @@ TEST(CmxParser, ReadsALastLineWithoutADelimiter)
 
 TEST(CmxParser, KeepsZerosAndBytesThatAreNoUtf8)
 {
-    const TestProject project;
     const std::string name = "\xE4\xFF\0\x80Z"s;
 
     const OnlyEvent event("\0garbage\n"s + Cut + "\n* NAME: " + name + "\n");
@@ -242,7 +220,6 @@ TEST(CmxParser, KeepsZerosAndBytesThatAreNoUtf8)
 
 TEST(CmxParser, ReadsLinesOfAnyLength)
 {
-    const TestProject project;
     // Longer than any buffer to start with, and each of another length.
     const std::string first(3000000, 'x');
     const std::string second(1000001, 'y');
@@ -258,7 +235,6 @@ TEST(CmxParser, ReadsLinesOfAnyLength)
 
 TEST(CmxParser, FindsADelimiterFarFromTheStart)
 {
-    const TestProject project;
     const std::string title = "TITLE: " + std::string(3000000, 'x');
 
     EXPECT_EQ(OnlyEvent(title + "\r" + Cut + "\r* NAME: A\r")->clipName(), "A");
@@ -267,7 +243,6 @@ TEST(CmxParser, FindsADelimiterFarFromTheStart)
 
 TEST(CmxParser, LosesNoLineAtTheEndsOfItsBuffer)
 {
-    const TestProject project;
     constexpr std::uint32_t Count = 20000;
     std::string text;
     for (std::uint32_t number = 1; number <= Count; ++number)
@@ -285,8 +260,6 @@ TEST(CmxParser, LosesNoLineAtTheEndsOfItsBuffer)
 
 TEST(CmxParser, FlagsAnEventNumberWithAnyOtherCharacter)
 {
-    const TestProject project;
-
     const OnlyEvent event("001A AX V C " + Timecodes);
 
     EXPECT_EQ(event.flaws(), Flaws{EventFlaw::EventNumberNotNumeric});
@@ -296,7 +269,6 @@ TEST(CmxParser, FlagsAnEventNumberWithAnyOtherCharacter)
 
 TEST(CmxParser, TakesTheGreatestNumberForOneThatIsTooLarge)
 {
-    const TestProject project;
     constexpr std::uint32_t GreatestNumber = std::numeric_limits<std::uint32_t>::max();
     constexpr std::int32_t GreatestDuration = std::numeric_limits<std::int32_t>::max();
 
@@ -311,8 +283,6 @@ TEST(CmxParser, TakesTheGreatestNumberForOneThatIsTooLarge)
 
 TEST(CmxParser, TakesLettersDigitsDotsDashesAndUnderscoresInARollName)
 {
-    const TestProject project;
-
     const OnlyEvent event("001 .-_azAZ09 V C " + Timecodes);
 
     EXPECT_EQ(event->rollName(), ".-_azAZ09");
@@ -321,8 +291,6 @@ TEST(CmxParser, TakesLettersDigitsDotsDashesAndUnderscoresInARollName)
 
 TEST(CmxParser, FlagsARollNameWithAnyOtherCharacter)
 {
-    const TestProject project;
-
     for (const std::string name : {"A/1", "A:1", "A*", "A@", "[A", "`A", "{A", "A,1", "\xC3\x84"}) {
         const OnlyEvent event("001 " + name + " V C " + Timecodes);
 
@@ -333,16 +301,12 @@ TEST(CmxParser, FlagsARollNameWithAnyOtherCharacter)
 
 TEST(CmxParser, TakesVideoChannels)
 {
-    const TestProject project;
-
     for (const std::string channel : {"V", "B", "AA/V", "V1", "xV", "NONEB"})
         EXPECT_TRUE(OnlyEvent("001 AX " + channel + " C " + Timecodes)->isValid()) << channel;
 }
 
 TEST(CmxParser, FlagsAudioChannelsUnlessTheyAreAccepted)
 {
-    const TestProject project;
-
     for (const std::string channel : {"A", "A2", "AA"}) {
         const std::string line = "001 AX " + channel + " C " + Timecodes;
 
@@ -353,8 +317,6 @@ TEST(CmxParser, FlagsAudioChannelsUnlessTheyAreAccepted)
 
 TEST(CmxParser, FlagsAnyOtherChannelAlsoWhereAudioIsAccepted)
 {
-    const TestProject project;
-
     for (const std::string channel : {"NONE", "a", "v", "b", "1"}) {
         EXPECT_EQ(OnlyEvent("001 AX " + channel + " C " + Timecodes, true).flaws(), Flaws{EventFlaw::NotVideoEvent})
             << channel;
@@ -363,7 +325,6 @@ TEST(CmxParser, FlagsAnyOtherChannelAlsoWhereAudioIsAccepted)
 
 TEST(CmxParser, LeavesAudioOutInTheShortForm)
 {
-    const TestProject project;
     const TempFolder folder;
     const auto path = folder.write("reel.edl", "001 AX A C " + Timecodes);
     EventList events;
@@ -376,8 +337,6 @@ TEST(CmxParser, LeavesAudioOutInTheShortForm)
 
 TEST(CmxParser, ReadsATransitionAndItsDuration)
 {
-    const TestProject project;
-
     const OnlyEvent dissolve("001 AX V D 024 " + Timecodes);
     EXPECT_EQ(dissolve->transitionType(), TransitionType::Dissolve);
     EXPECT_EQ(dissolve->transitionDuration(), 24);
@@ -392,8 +351,6 @@ TEST(CmxParser, ReadsATransitionAndItsDuration)
 
 TEST(CmxParser, LooksAtTheFirstLetterOfATransitionOnly)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent("001 AX V W001 010 " + Timecodes)->transitionType(), TransitionType::Wipe);
     EXPECT_EQ(OnlyEvent("001 AX V W001 010 " + Timecodes)->transitionDuration(), 10);
     EXPECT_EQ(OnlyEvent("001 AX V Dxyz 010 " + Timecodes)->transitionType(), TransitionType::Dissolve);
@@ -402,8 +359,6 @@ TEST(CmxParser, LooksAtTheFirstLetterOfATransitionOnly)
 
 TEST(CmxParser, UsesUpADurationThatIsNoNumber)
 {
-    const TestProject project;
-
     const OnlyEvent event("001 AX V D 24f " + Timecodes);
 
     EXPECT_EQ(event.flaws(), Flaws{EventFlaw::TransitionDurationInvalid});
@@ -414,8 +369,6 @@ TEST(CmxParser, UsesUpADurationThatIsNoNumber)
 
 TEST(CmxParser, ReadsTheTimecodesBehindAnUnknownTransitionAsThoseOfACut)
 {
-    const TestProject project;
-
     for (const std::string transition : {"K", "c", "KB", "1"}) {
         const OnlyEvent event("001 AX V " + transition + " " + Timecodes);
 
@@ -427,8 +380,6 @@ TEST(CmxParser, ReadsTheTimecodesBehindAnUnknownTransitionAsThoseOfACut)
 
 TEST(CmxParser, TakesTimecodesWithOneDigitFieldsAndWithASemicolon)
 {
-    const TestProject project;
-
     const OnlyEvent event("001 AX V C 1:2:3;4 01:00:05:00 02:00:00;00 2:0:05:0");
 
     EXPECT_EQ(timecodesOf(*event), "01:02:03:04 01:00:05:00 02:00:00:00 02:00:05:00");
@@ -436,7 +387,6 @@ TEST(CmxParser, TakesTimecodesWithOneDigitFieldsAndWithASemicolon)
 
 TEST(CmxParser, FlagsEachTimecodeThatCannotBeRead)
 {
-    const TestProject project;
     const std::string good = "01:00:00:00";
 
     for (const std::string bad : {"101:00:00:00", "01:00:00:00A", "01:00:00", "01:00:00:00:00", "01;00:00:00",
@@ -460,8 +410,6 @@ TEST(CmxParser, FlagsEachTimecodeThatCannotBeRead)
 
 TEST(CmxParser, KeepsAnEventWithEveryFlawOfItsFields)
 {
-    const TestProject project;
-
     const OnlyEvent event("0x1 A/X N D 2f a b c d");
 
     EXPECT_EQ(event.flaws(), (Flaws{0, 2, 3, 4, 5, 7, 8, 9, 10}));
@@ -470,8 +418,6 @@ TEST(CmxParser, KeepsAnEventWithEveryFlawOfItsFields)
 
 TEST(CmxParser, LeavesTheTestOfTimecodesToTheEvent)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent("001 AX V C 01:00:05:00 01:00:00:00 02:00:00:00 02:00:05:00").flaws(),
               Flaws{EventFlaw::TimecodeRangeInvalid});
     EXPECT_EQ(OnlyEvent("001 AX V C 01:00:00:25 01:00:05:00 02:00:00:00 02:00:05:00").flaws(),
@@ -480,8 +426,6 @@ TEST(CmxParser, LeavesTheTestOfTimecodesToTheEvent)
 
 TEST(CmxParser, KeepsTheRangeFlawOfTheTimecodesReadBeforeAnInvalidOne)
 {
-    const TestProject project;
-
     // While SRC OUT is still 00:00:00:00, SRC IN lies behind it. The invalid SRC OUT leaves that flaw where it is.
     EXPECT_EQ(OnlyEvent("001 AX V C 01:00:00:00 99:99:99:99 02:00:00:00 02:00:05:00").flaws(),
               (Flaws{EventFlaw::TimecodeInvalid, EventFlaw::TimecodeRangeInvalid}));
@@ -491,8 +435,6 @@ TEST(CmxParser, KeepsTheRangeFlawOfTheTimecodesReadBeforeAnInvalidOne)
 
 TEST(CmxParser, DropsALineWithTooFewPieces)
 {
-    const TestProject project;
-
     EXPECT_EQ(countOf("001"), 0U);
     EXPECT_EQ(countOf("001 AX"), 0U);
     EXPECT_EQ(countOf("001 AX V"), 0U);
@@ -505,8 +447,6 @@ TEST(CmxParser, DropsALineWithTooFewPieces)
 
 TEST(CmxParser, TakesTheFirstTimecodeForTheDurationThatAWipeLacks)
 {
-    const TestProject project;
-
     EXPECT_EQ(countOf("001 AX V W " + Timecodes), 0U);
     EXPECT_EQ(OnlyEvent("001 AX V W " + Timecodes + " 02:00:06:00").flaws(),
               (Flaws{EventFlaw::TransitionDurationInvalid}));
@@ -515,8 +455,6 @@ TEST(CmxParser, TakesTheFirstTimecodeForTheDurationThatAWipeLacks)
 
 TEST(CmxParser, CutsFieldsAtBlanksOnly)
 {
-    const TestProject project;
-
     // A tab between two fields makes them one, which is a roll name with a tab in it here.
     EXPECT_EQ(OnlyEvent("001 A\tX V C " + Timecodes).flaws(), Flaws{EventFlaw::RollNameInvalid});
     EXPECT_EQ(countOf("001\tAX V C " + Timecodes), 0U);
@@ -524,8 +462,6 @@ TEST(CmxParser, CutsFieldsAtBlanksOnly)
 
 TEST(CmxParser, TrimsEachField)
 {
-    const TestProject project;
-
     const OnlyEvent event("001\t \tAX\t V\t \tC 01:00:00:00\t \t01:00:05:00 02:00:00:00 02:00:05:00");
 
     EXPECT_EQ(event->eventNumber(), 1U);
@@ -535,8 +471,6 @@ TEST(CmxParser, TrimsEachField)
 
 TEST(CmxParser, CountsAFieldOfMereTabs)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent("001 \t V C " + Timecodes)->rollName(), "");
     EXPECT_TRUE(OnlyEvent("001 \t V C " + Timecodes)->isValid());
     EXPECT_EQ(OnlyEvent("001 AX \t C " + Timecodes).flaws(), Flaws{EventFlaw::NotVideoEvent});
@@ -547,8 +481,6 @@ TEST(CmxParser, CountsAFieldOfMereTabs)
 
 TEST(CmxParser, TakesTheClipNameFromAComment)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent(Cut + "\n* FROM CLIP NAME:  SHOT_12 A \t\n")->clipName(), "SHOT_12 A");
     EXPECT_EQ(OnlyEvent(Cut + "\n*NAME:x")->clipName(), "x");
     EXPECT_EQ(OnlyEvent(Cut + "\n* NAME: first NAME: second")->clipName(), "first NAME: second");
@@ -556,24 +488,18 @@ TEST(CmxParser, TakesTheClipNameFromAComment)
 
 TEST(CmxParser, TakesNoClipNameFromOtherLines)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent(Cut + "\n* from clip name: a\n* FROM CLIP: b\n* SOURCE FILE: c\nFROM CLIP NAME: d")->clipName(),
               "");
 }
 
 TEST(CmxParser, CollectsTheCommentLinesOfAnEvent)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent(Cut + "\n  * FROM CLIP NAME: A  \nTITLE: X\n*\n\n* LOC: 01:00:00:00 RED\n")->comment(),
               Cut + "\n* FROM CLIP NAME: A\n*\n* LOC: 01:00:00:00 RED");
 }
 
 TEST(CmxParser, GivesTheLaterOfTwoClipNamesToAnEventOfOneLine)
 {
-    const TestProject project;
-
     const OnlyEvent event(Cut + "\n* FROM CLIP NAME: A\n* TO CLIP NAME: B\n");
 
     EXPECT_EQ(event->clipName(), "B");
@@ -582,8 +508,6 @@ TEST(CmxParser, GivesTheLaterOfTwoClipNamesToAnEventOfOneLine)
 
 TEST(CmxParser, IgnoresACommentWithAnEmptyName)
 {
-    const TestProject project;
-
     const OnlyEvent event(Cut + "\n* FROM CLIP NAME: A\n* SOURCE: NAME: \t\n* SOURCE: NAME:");
 
     EXPECT_EQ(event->clipName(), "A");
@@ -592,7 +516,6 @@ TEST(CmxParser, IgnoresACommentWithAnEmptyName)
 
 TEST(CmxParser, DividesTheCommentsOfATransitionInTwoLines)
 {
-    const TestProject project;
     const std::string first = "002 AX V C 01:00:00:00 01:00:00:00 02:00:00:00 02:00:00:00";
     const std::string second = "002 BX V D 024 " + Timecodes;
 
@@ -610,8 +533,6 @@ TEST(CmxParser, DividesTheCommentsOfATransitionInTwoLines)
 
 TEST(CmxParser, GivesCommentsBetweenTheLinesOfATransitionToTheFirst)
 {
-    const TestProject project;
-
     const EdlReading reading(Cut + "\n002 AX V C " + Timecodes + "\n* NOTE\n002 BX V D 024 " + Timecodes +
                              "\n* FROM CLIP NAME: A\n003 CX V C " + Timecodes + "\n* FROM CLIP NAME: C\n");
 
@@ -623,8 +544,6 @@ TEST(CmxParser, GivesCommentsBetweenTheLinesOfATransitionToTheFirst)
 
 TEST(CmxParser, TakesAFirstEventOfNumberZeroForTheSecondLineOfATransition)
 {
-    const TestProject project;
-
     const OnlyEvent event("000 AX V C " + Timecodes + "\n* FROM CLIP NAME: A\n* NOTE NAME: B\n* TO CLIP NAME: C\n");
 
     EXPECT_EQ(event->clipName(), "C");
@@ -633,8 +552,6 @@ TEST(CmxParser, TakesAFirstEventOfNumberZeroForTheSecondLineOfATransition)
 
 TEST(CmxParser, TakesTwoEventsWithoutAReadableNumberForATransition)
 {
-    const TestProject project;
-
     const EdlReading reading("1a AX V C " + Timecodes + "\n2b BX V C " + Timecodes + "\n* FROM CLIP NAME: A\n");
 
     ASSERT_EQ(reading.events.size(), 2U);
@@ -644,8 +561,6 @@ TEST(CmxParser, TakesTwoEventsWithoutAReadableNumberForATransition)
 
 TEST(CmxParser, IgnoresTheCommentsBehindADroppedLine)
 {
-    const TestProject project;
-
     const OnlyEvent event(Cut + "\n001 AX V D 024 01:00:00:00\n* FROM CLIP NAME: A\n");
 
     EXPECT_EQ(event->clipName(), "");
@@ -654,8 +569,6 @@ TEST(CmxParser, IgnoresTheCommentsBehindADroppedLine)
 
 TEST(CmxParser, ComparesNumbersWithTheEventBeforeADroppedLine)
 {
-    const TestProject project;
-
     // The event before the dropped one went into the list when the dropped one began, and "previous" it still is.
     const EdlReading reading("005 AX V C " + Timecodes + "\n006 AX\n005 BX V D 010 " + Timecodes +
                              "\n* FROM CLIP NAME: A\n* TO CLIP NAME: B\n");
@@ -667,15 +580,11 @@ TEST(CmxParser, ComparesNumbersWithTheEventBeforeADroppedLine)
 
 TEST(CmxParser, IgnoresCommentsBeforeTheFirstEvent)
 {
-    const TestProject project;
-
     EXPECT_EQ(OnlyEvent("* FROM CLIP NAME: A\n" + Cut)->comment(), Cut);
 }
 
 TEST(CmxParser, LetsAFrameCountModeStandBetweenAnEventAndItsComments)
 {
-    const TestProject project;
-
     const OnlyEvent event(Cut + "\nFCM: NON-DROP FRAME\n* FROM CLIP NAME: A");
 
     EXPECT_EQ(event->clipName(), "A");
@@ -684,8 +593,6 @@ TEST(CmxParser, LetsAFrameCountModeStandBetweenAnEventAndItsComments)
 
 TEST(CmxParser, ReadsTheFrameCountMode)
 {
-    const TestProject project;
-
     EXPECT_EQ(rateOf("FCM: NON-DROP FRAME\n" + cutWithFrames("10")), (ShownRate{24, 0}));
     EXPECT_EQ(rateOf("FCM: DROP FRAME\n" + cutWithFrames("10")), (ShownRate{30, 1}));
     EXPECT_EQ(rateOf("FCM: SOMETHING\n" + cutWithFrames("10")), (ShownRate{24, -1}));
@@ -699,8 +606,6 @@ TEST(CmxParser, ReadsTheFrameCountMode)
 
 TEST(CmxParser, LetsALaterFrameCountModeHoldForTheWholeFile)
 {
-    const TestProject project;
-
     EXPECT_EQ(rateOf("FCM: DROP FRAME\n" + cutWithFrames("10") + "FCM: NON-DROP FRAME\n"), (ShownRate{24, 0}));
     EXPECT_EQ(rateOf("FCM: NON-DROP FRAME\n" + cutWithFrames("10") + "FCM: DROP FRAME\n"), (ShownRate{30, 1}));
     EXPECT_EQ(rateOf("FCM: DROP FRAME\n" + cutWithFrames("10") + "FCM: SOMETHING\n"), (ShownRate{30, 1}));
@@ -708,7 +613,6 @@ TEST(CmxParser, LetsALaterFrameCountModeHoldForTheWholeFile)
 
 TEST(CmxParser, DetectsTheLeastRateThatHoldsTheHighestFrame)
 {
-    const TestProject project;
     const auto rateForFrames = [](const std::string& frames) { return rateOf(cutWithFrames(frames)).framesPerSecond; };
 
     EXPECT_EQ(rateForFrames("00"), 0);
@@ -723,8 +627,6 @@ TEST(CmxParser, DetectsTheLeastRateThatHoldsTheHighestFrame)
 
 TEST(CmxParser, CountsNoFramesOfSixtyOrMore)
 {
-    const TestProject project;
-
     EXPECT_EQ(rateOf(cutWithFrames("60")), (ShownRate{0, -1}));
     EXPECT_EQ(rateOf(cutWithFrames("60") + cutWithFrames("99") + cutWithFrames("12")), (ShownRate{24, -1}));
     EXPECT_TRUE(OnlyEvent(cutWithFrames("60"))->hasFlaw(EventFlaw::TimecodeInvalid));
@@ -732,8 +634,6 @@ TEST(CmxParser, CountsNoFramesOfSixtyOrMore)
 
 TEST(CmxParser, CountsEachOfTheFourTimecodes)
 {
-    const TestProject project;
-
     EXPECT_EQ(rateOf("001 AX V C 01:00:00:29 01:00:05:00 02:00:00:00 02:00:05:00").framesPerSecond, 30);
     EXPECT_EQ(rateOf("001 AX V C 01:00:00:00 01:00:05:29 02:00:00:00 02:00:05:00").framesPerSecond, 30);
     EXPECT_EQ(rateOf("001 AX V C 01:00:00:00 01:00:05:00 02:00:00:29 02:00:05:00").framesPerSecond, 30);
@@ -742,15 +642,12 @@ TEST(CmxParser, CountsEachOfTheFourTimecodes)
 
 TEST(CmxParser, CountsTheTimecodesOfADroppedLineUpToItsEnd)
 {
-    const TestProject project;
-
     EXPECT_EQ(rateOf("001 AX V C 01:00:00:00 01:00:05:24").framesPerSecond, 25);
     EXPECT_EQ(rateOf("001 AX V D 01:00:05:24 01:00:05:12").framesPerSecond, 24);
 }
 
 TEST(CmxParser, GoesOnCountingInASecondFileButForgetsTheFrameCountMode)
 {
-    const TestProject project;
     const TempFolder folder;
     const auto first = folder.write("first.edl", "FCM: DROP FRAME\n" + cutWithFrames("29"));
     const auto second = folder.write("second.edl", cutWithFrames("10"));
@@ -767,6 +664,7 @@ TEST(CmxParser, GoesOnCountingInASecondFileButForgetsTheFrameCountMode)
 
 TEST(CmxParser, DetectsTheRateWithoutAProject)
 {
+    const NoProject none;
     const TempFolder folder;
     const PlainConverter converter;
     util::StringUtil::setConverter(&converter);
@@ -782,6 +680,7 @@ TEST(CmxParser, DetectsTheRateWithoutAProject)
 
 TEST(CmxParser, DropsEveryEventWithoutAProject)
 {
+    const NoProject none;
     const TempFolder folder;
     const PlainConverter converter;
     util::StringUtil::setConverter(&converter);
@@ -816,7 +715,6 @@ void expectRefused(const std::wstring& path, Result::Type expected)
 
 TEST(CmxParser, RefusesWhatCannotBeOpened)
 {
-    const TestProject project;
     const TempFolder folder;
 
     expectRefused(widePath(folder / "missing.edl"), Result::FileAccessFailed);
@@ -826,7 +724,6 @@ TEST(CmxParser, RefusesWhatCannotBeOpened)
 
 TEST(CmxParser, RefusesWhatIsNoRegularFile)
 {
-    const TestProject project;
     const TempFolder folder;
     ASSERT_EQ(mkfifo((folder / "pipe").c_str(), 0600), 0);
 
@@ -838,16 +735,12 @@ TEST(CmxParser, RefusesWhatIsNoRegularFile)
 
 TEST(CmxParser, RefusesAReadThatBreaksOff)
 {
-    const TestProject project;
-
     // It opens as a regular file, and its first bytes can't be read.
     expectRefused(L"/proc/self/mem", Result::FileAccessFailed);
 }
 
 TEST(CmxParser, ReturnsWhatTheConversionOfThePathThrows)
 {
-    const TestProject project;
-
     expectRefused(L"reel\xD800.edl", Result::InvalidArgument);
     util::StringUtil::setConverter(nullptr);
     expectRefused(L"reel.edl", Result::NotAvailable);
@@ -855,7 +748,6 @@ TEST(CmxParser, ReturnsWhatTheConversionOfThePathThrows)
 
 TEST(CmxParser, RefusesAPathWithAZeroInIt)
 {
-    const TestProject project;
     const TempFolder folder;
 
     expectRefused(widePath(folder.write("reel.edl", Cut)) + L"\0.edl"s, Result::FileAccessFailed);
@@ -863,7 +755,6 @@ TEST(CmxParser, RefusesAPathWithAZeroInIt)
 
 TEST(CmxParser, TakesTheFileNameBehindTheLastSeparator)
 {
-    const TestProject project;
     const TempFolder folder;
     const auto fileNameOf = [&](const std::string& name) {
         EventList events;
@@ -911,7 +802,6 @@ RC_GTEST_PROP(CmxParserLaw, DetectingGivesTheRateThatParsingGives, ())
 
 RC_GTEST_PROP(CmxParserLaw, EveryDelimiterGivesTheSameEvents, ())
 {
-    const TestProject project;
     std::string text = anyEdlText();
     std::erase(text, '\r');
     std::string carriageReturns = text;
@@ -937,8 +827,6 @@ RC_GTEST_PROP(CmxParserLaw, EveryDelimiterGivesTheSameEvents, ())
 
 RC_GTEST_PROP(CmxParserLaw, EveryEventKeepsItsLineAsTheFirstOfItsComment, ())
 {
-    const TestProject project;
-
     const EdlReading reading(anyEdlText());
 
     for (const auto& event : reading.events.events()) {

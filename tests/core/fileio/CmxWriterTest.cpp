@@ -5,10 +5,10 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/util/FileSizeLimit.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/FileSizeLimit.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/TestProject.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
@@ -82,7 +82,6 @@ std::size_t linesOf(const std::string& text)
 
 TEST(CmxWriter, WritesATitleAndALineForEachCut)
 {
-    const TestProject project;
     EventList events;
     events.add(makeEvent("A001C003", "10:00:00:00", "10:00:04:00", "01:00:00:00", "01:00:04:00", 77));
     events.add(makeEvent("abc", "1:2:3:4", "1:2:3:5", "23:59:59:23", "23:59:59:24"));
@@ -94,7 +93,6 @@ TEST(CmxWriter, WritesATitleAndALineForEachCut)
 
 TEST(CmxWriter, WritesTheLetterOfATransitionWithoutItsDuration)
 {
-    const TestProject project;
     EventList events = listOfCuts(3);
     events.at(0).setTransitionType(TransitionType::Dissolve);
     events.at(0).setTransitionDuration(24);
@@ -114,7 +112,6 @@ TEST(CmxWriter, WritesTheLetterOfATransitionWithoutItsDuration)
 
 TEST(CmxWriter, WritesNeitherClipNamesNorComments)
 {
-    const TestProject project;
     EventList events = listOfCuts(1);
     events.at(0).setClipName("CLIP");
     events.at(0).setComment("* NOTE");
@@ -125,7 +122,6 @@ TEST(CmxWriter, WritesNeitherClipNamesNorComments)
 
 TEST(CmxWriter, LeavesAnInvalidEventOutButCountsIt)
 {
-    const TestProject project;
     EventList events = listOfCuts(3);
     events.at(1).addFlaw(EventFlaw::NotVideoEvent);
 
@@ -139,7 +135,6 @@ TEST(CmxWriter, LeavesAnInvalidEventOutButCountsIt)
 
 TEST(CmxWriter, WritesATitleAloneForReadableEventsThatAreAllInvalid)
 {
-    const TestProject project;
     EventList events = listOfCuts(1);
     events.at(0).addFlaw(EventFlaw::TimecodeRangeInvalid);
 
@@ -158,7 +153,6 @@ TEST(CmxWriter, WritesDropFrameTimecodesWithColons)
 
 TEST(CmxWriter, CutsTheTitleToSeventyCharacters)
 {
-    const TestProject project;
     const std::string seventy(70, 'n');
 
     EXPECT_EQ(titleOf(seventy), "TITLE:   " + seventy);
@@ -167,8 +161,6 @@ TEST(CmxWriter, CutsTheTitleToSeventyCharacters)
 
 TEST(CmxWriter, WritesAPrintableTitle)
 {
-    const TestProject project;
-
     EXPECT_EQ(titleOf("a\tb\x7F"
                       "c d~.edl"),
               "TITLE:   a?b?c d~.edl");
@@ -178,14 +170,11 @@ TEST(CmxWriter, WritesAPrintableTitle)
 
 TEST(CmxWriter, TakesTheTitleBehindABackslashOnlyWhereThePathHasOne)
 {
-    const TestProject project;
-
     EXPECT_EQ(titleOf("C:\\films\\reel.edl"), "TITLE:   reel.edl");
 }
 
 TEST(CmxWriter, FillsTheColumnOfTheRollName)
 {
-    const TestProject project;
     EventList events;
     for (const std::string roll : {"", "abc", "        ", "ABCDEFGHIJ"})
         events.add(makeCut(roll));
@@ -259,7 +248,6 @@ TEST(CmxWriterRollName, IsCutWhereItIsAllDigits)
 
 TEST(CmxWriter, WritesNineHundredNinetyNineEventsIntoOneFile)
 {
-    const TestProject project;
     const TempFolder folder;
 
     EXPECT_EQ(write(folder / "reel.edl", listOfCuts(999)), Result::Ok);
@@ -272,7 +260,6 @@ TEST(CmxWriter, WritesNineHundredNinetyNineEventsIntoOneFile)
 
 TEST(CmxWriter, SplitsMoreEventsIntoSeveralFiles)
 {
-    const TestProject project;
     const TempFolder folder;
     EventList events = listOfCuts(999);
     events.add(makeCut("LAST"));
@@ -289,7 +276,6 @@ TEST(CmxWriter, SplitsMoreEventsIntoSeveralFiles)
 
 TEST(CmxWriter, SplitsAtEveryNineHundredNinetyNineEvents)
 {
-    const TestProject project;
     const TempFolder folder;
 
     EXPECT_EQ(write(folder / "two.edl", listOfCuts(1998)), Result::Ok);
@@ -301,7 +287,6 @@ TEST(CmxWriter, SplitsAtEveryNineHundredNinetyNineEvents)
 
 TEST(CmxWriter, NamesTheFilesOfAPathWithoutAnExtensionWithADotAtTheEnd)
 {
-    const TestProject project;
     const TempFolder folder;
 
     EXPECT_EQ(write(folder / "reel", listOfCuts(1000)), Result::Ok);
@@ -311,7 +296,6 @@ TEST(CmxWriter, NamesTheFilesOfAPathWithoutAnExtensionWithADotAtTheEnd)
 
 TEST(CmxWriter, AsksTheWholeListForAReadableEventBeforeItSplits)
 {
-    const TestProject project;
     const TempFolder folder;
     EventList events = listOfCuts(1000);
     for (std::size_t index = 0; index < 999; ++index)
@@ -325,7 +309,6 @@ TEST(CmxWriter, AsksTheWholeListForAReadableEventBeforeItSplits)
 
 TEST(CmxWriter, RefusesAnEmptyList)
 {
-    const TestProject project;
     const TempFolder folder;
 
     EXPECT_EQ(write(folder / "reel.edl", EventList()), Result::InvalidArgument);
@@ -334,7 +317,6 @@ TEST(CmxWriter, RefusesAnEmptyList)
 
 TEST(CmxWriter, RefusesAListWithoutAReadableEvent)
 {
-    const TestProject project;
     const TempFolder folder;
     EventList events = listOfCuts(1000);
     for (const auto& event : events.events())
@@ -346,7 +328,6 @@ TEST(CmxWriter, RefusesAListWithoutAReadableEvent)
 
 TEST(CmxWriter, ReportsAFileThatCannotBeOpened)
 {
-    const TestProject project;
     const TempFolder folder;
 
     EXPECT_EQ(write(folder.path(), listOfCuts(1)), Result::FileAccessFailed);
@@ -360,7 +341,6 @@ TEST(CmxWriter, ReportsAFileThatCannotBeOpened)
 
 TEST(CmxWriter, RefusesAnEmptyLastComponentAndLeavesNoFile)
 {
-    const TestProject project;
     const TempFolder folder;
 
     // The system takes a backslash for a letter of a name, so that this file can be opened.
@@ -370,7 +350,6 @@ TEST(CmxWriter, RefusesAnEmptyLastComponentAndLeavesNoFile)
 
 TEST(CmxWriter, ReturnsWhatTheConversionOfThePathThrows)
 {
-    const TestProject project;
     const EventList events = listOfCuts(1);
 
     EXPECT_EQ(CmxWriter().write(L"reel\xD800.edl", events), Result::InvalidArgument);
@@ -380,7 +359,6 @@ TEST(CmxWriter, ReturnsWhatTheConversionOfThePathThrows)
 
 TEST(CmxWriter, ReportsAFullDiskAndLeavesTheFormerFile)
 {
-    const TestProject project;
     const TempFolder folder;
     folder.write("reel.edl", "former");
     folder.write("reel_1.edl", "former 1");
@@ -404,8 +382,6 @@ TEST(CmxWriter, ReportsAFullDiskAndLeavesTheFormerFile)
 
 TEST(CmxWriter, WritesADeviceItselfAndNeverRemovesIt)
 {
-    const TestProject project;
-
     EXPECT_EQ(write("/dev/null", listOfCuts(1)), Result::Ok);
     EXPECT_EQ(write("/dev/full", listOfCuts(1)), Result::FileAccessFailed);
     EXPECT_TRUE(fs::is_character_file("/dev/null"));
@@ -414,7 +390,6 @@ TEST(CmxWriter, WritesADeviceItselfAndNeverRemovesIt)
 
 TEST(CmxWriter, PutsNoFileInPlaceWhenALaterOneCannotBeOpened)
 {
-    const TestProject project;
     const TempFolder folder;
     folder.write("reel_1.edl", "former");
     fs::create_directory(folder / "reel_2.edl");
@@ -427,7 +402,6 @@ TEST(CmxWriter, PutsNoFileInPlaceWhenALaterOneCannotBeOpened)
 
 TEST(CmxWriter, LeavesTheFormerFilesWhenALaterOneCannotBeWritten)
 {
-    const TestProject project;
     const TempFolder folder;
     folder.write("reel_1.edl", "former");
     fs::create_symlink("/dev/full", folder / "reel_2.edl");
@@ -441,7 +415,6 @@ TEST(CmxWriter, LeavesTheFormerFilesWhenALaterOneCannotBeWritten)
 
 TEST(CmxWriter, ReplacesTheFilesOfAFormerSplit)
 {
-    const TestProject project;
     const TempFolder folder;
     folder.write("reel_1.edl", "former 1");
     folder.write("reel_2.edl", "former 2");

@@ -3,12 +3,11 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/time/Framerate.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/fileio/EdlReading.h"
-#include "tests/core/notify/RecordingListener.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EdlReading.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/RecordingListener.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>
@@ -60,7 +59,6 @@ Names renamed(const Names& rolls)
 
 TEST(EventListFiles, LoadsInPlaceOfThePresentEvents)
 {
-    const TestProject project;
     const TempFolder folder;
     const auto path = folder.write("reel.edl", edlOf({"NEW"}));
     EventList events;
@@ -73,7 +71,6 @@ TEST(EventListFiles, LoadsInPlaceOfThePresentEvents)
 
 TEST(EventListFiles, LoadsBehindThePresentEvents)
 {
-    const TestProject project;
     const TempFolder folder;
     const auto path = folder.write("reel.edl", edlOf({"NEW", "NEWER"}));
     EventList events;
@@ -89,7 +86,6 @@ TEST(EventListFiles, LoadsBehindThePresentEvents)
 
 TEST(EventListFiles, GivesTheRateThatTheFileShows)
 {
-    const TestProject project;
     const TempFolder folder;
     EventList events;
     Framerate framerate(60, 0);
@@ -101,7 +97,6 @@ TEST(EventListFiles, GivesTheRateThatTheFileShows)
 
 TEST(EventListFiles, AcceptsAudioWhereItIsAskedTo)
 {
-    const TestProject project;
     const TempFolder folder;
     const std::wstring path = widePath(folder.write("reel.edl", "001 AX A C " + Timecodes));
     EventList events;
@@ -119,7 +114,6 @@ TEST(EventListFiles, AcceptsAudioWhereItIsAskedTo)
 
 TEST(EventListFiles, NotifiesOfTheClearingAndOfTheLoading)
 {
-    const TestProject project;
     const TempFolder folder;
     const std::wstring path = widePath(folder.write("reel.edl", edlOf({"A", "AB", "B"})));
     EventList events(ListKind::New);
@@ -143,7 +137,6 @@ TEST(EventListFiles, NotifiesOfTheClearingAndOfTheLoading)
 
 TEST(EventListFiles, StaysClearedAfterAFailure)
 {
-    const TestProject project;
     const TempFolder folder;
     EventList events;
     events.add(std::make_shared<EventBase>());
@@ -159,7 +152,6 @@ TEST(EventListFiles, StaysClearedAfterAFailure)
 
 TEST(EventListFiles, KeepsThePresentEventsAfterAFailureToAppend)
 {
-    const TestProject project;
     EventList events;
     events.add(std::make_shared<EventBase>());
     Framerate framerate(25, 0);
@@ -172,16 +164,12 @@ TEST(EventListFiles, KeepsThePresentEventsAfterAFailureToAppend)
 
 TEST(EventListFiles, NamesABRollLikeItsRoll)
 {
-    const TestProject project;
-
     EXPECT_EQ(renamed({"A001B", "A001"}), (Names{"A001", "A001"}));
     EXPECT_EQ(renamed({"A001", "A001B", "A001B"}), (Names{"A001", "A001", "A001"}));
 }
 
 TEST(EventListFiles, KeepsABRollWithoutItsRoll)
 {
-    const TestProject project;
-
     EXPECT_EQ(renamed({"A002B", "A001"}), (Names{"A002B", "A001"}));
     EXPECT_EQ(renamed({"A001b", "A001"}), (Names{"A001b", "A001"}));
     EXPECT_EQ(renamed({"B", "A"}), (Names{"B", "A"}));
@@ -189,23 +177,18 @@ TEST(EventListFiles, KeepsABRollWithoutItsRoll)
 
 TEST(EventListFiles, NamesARollBLikeOneWithoutAName)
 {
-    const TestProject project;
-
     // "X/1" can't be read as a roll name, which leaves the name empty.
     EXPECT_EQ(renamed({"B", "X/1"}), (Names{"", ""}));
 }
 
 TEST(EventListFiles, LooksForTheRollAmongTheNamesAsTheyWereRead)
 {
-    const TestProject project;
-
     EXPECT_EQ(renamed({"A1BB", "A1B", "A1"}), (Names{"A1B", "A1", "A1"}));
     EXPECT_EQ(renamed({"A1B", "A1BB"}), (Names{"A1B", "A1B"}));
 }
 
 TEST(EventListFiles, LeavesBRollsAloneUnlessItIsAskedTo)
 {
-    const TestProject project;
     const TempFolder folder;
     const std::wstring path = widePath(folder.write("reel.edl", edlOf({"A001B", "A001"})));
     EventList events;
@@ -217,7 +200,6 @@ TEST(EventListFiles, LeavesBRollsAloneUnlessItIsAskedTo)
 
 TEST(EventListFiles, LooksForTheRollAmongTheNewEventsOnly)
 {
-    const TestProject project;
     const TempFolder folder;
     EventList events;
     Framerate framerate;
@@ -230,7 +212,6 @@ TEST(EventListFiles, LooksForTheRollAmongTheNewEventsOnly)
 
 TEST(EventListFiles, SavesWhatItCanLoad)
 {
-    const TestProject project;
     const TempFolder folder;
     const std::wstring path = widePath(folder / "reel.edl");
     EventList events;
@@ -248,7 +229,6 @@ TEST(EventListFiles, SavesWhatItCanLoad)
 
 TEST(EventListFiles, ThrowsWhatTheWriterReturns)
 {
-    const TestProject project;
     const TempFolder folder;
     EventList events;
 
@@ -260,7 +240,6 @@ TEST(EventListFiles, ThrowsWhatTheWriterReturns)
 
 TEST(EventListFiles, AppendsEventsThatNoListListenedTo)
 {
-    const TestProject project;
     EventList events;
     RecordingListener listener;
     events.addListener(&listener);

@@ -4,9 +4,9 @@
 #include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
 #include "core/time/Framerate.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/fileio/EdlReading.h"
 #include "tests/support/TreePaths.h"
+#include "tests/support/core/EdlReading.h"
+#include "tests/support/core/TestProject.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>
@@ -153,6 +153,7 @@ TEST(RealEdl, EachFileGivesTheEventsThatStandInIt)
 
 TEST(RealEdl, EachFileShowsItsRateWithoutAProject)
 {
+    const NoProject none;
     const PlainConverter converter;
     util::StringUtil::setConverter(&converter);
     for (const Content& content : Contents) {

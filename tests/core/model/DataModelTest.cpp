@@ -4,11 +4,11 @@
 
 #include "core/model/DataModelCommandCreator.h"
 #include "core/serialize/ByteArchive.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/model/HexBytes.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/HexBytes.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 

@@ -6,11 +6,11 @@
 #include "core/model/DataModel.h"
 #include "core/serialize/ByteArchive.h"
 #include "core/time/Timecode.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/model/HexBytes.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/HexBytes.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -753,7 +753,6 @@ void limitMemory()
 
 TEST(HostileCountDeathTest, NoCountMakesAReaderTakeMemoryForWhatIsNotThere)
 {
-    const TestProject project;
     const std::string lists = "01 00 00 00 " + ThreeEmptyLists;
     const auto allAreRefused = [&] {
         EventBase event;
@@ -874,7 +873,6 @@ TEST_F(PersistedLayout, AnOldestModelThatBreaksOffAnywhereIsEmptyAndOfUnknownVer
 
 RC_GTEST_PROP(PersistedModel, ChangedBytesNeverDoWorseThanAResult, ())
 {
-    const TestProject project;
     DataModel source;
     fill(source);
     std::vector<std::uint8_t> bytes = written(source);
@@ -974,7 +972,6 @@ void fillWithAnything(DataModel& model)
 
 RC_GTEST_PROP(PersistedModel, AModelFilledThroughItsOperationsSurvivesByteForByte, ())
 {
-    const TestProject project;
     DataModel source;
     fillWithAnything(source);
     const std::vector<std::uint8_t> bytes = written(source);

@@ -2,10 +2,10 @@
 
 #include "core/model/VideoList.h"
 
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/model/HexBytes.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/HexBytes.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 
@@ -18,6 +18,7 @@ using cadrel::core::Timecode;
 using cadrel::core::serialize::ByteArchive;
 using cadrel::tests::archiveOf;
 using cadrel::tests::bytesOf;
+using cadrel::tests::NoProject;
 using cadrel::tests::RecordingListener;
 using cadrel::tests::TestProject;
 using cadrel::tests::thrownBy;
@@ -148,6 +149,7 @@ TEST_F(VideoList, RefusesAPathThatIsNoText)
 
 TEST(VideoListWithoutAProject, FailsWithoutAConverter)
 {
+    const NoProject none;
     const cadrel::core::VideoList list;
 
     EXPECT_EQ(thrownBy([&] { list.containsFile("/v/one.mov"); }), Result::NotAvailable);
@@ -243,6 +245,7 @@ TEST_F(VideoList, CheckFailsForTimecodesThatAreNotValid)
 
 TEST(VideoListWithoutAProject, CheckFailsWithoutAFrameRate)
 {
+    const NoProject none;
     const cadrel::core::VideoList list;
 
     EXPECT_EQ(thrownBy([&] { list.checkAdd(video("/v/x.mov", "00:00:00:00")); }), Result::NotAvailable);

@@ -6,8 +6,8 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/RecordingListener.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>

@@ -3,8 +3,8 @@
 #include "core/serialize/Serializable.h"
 
 #include "core/serialize/ByteArchive.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/model/HexBytes.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/HexBytes.h"
 
 #include <gtest/gtest.h>
 

@@ -2,9 +2,9 @@
 
 #include "core/settings/Settings.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/model/HexBytes.h"
-#include "tests/core/notify/RecordingListener.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/HexBytes.h"
+#include "tests/support/core/RecordingListener.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>

@@ -2,8 +2,8 @@
 
 #include "core/settings/Variant.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/core/model/HexBytes.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/HexBytes.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>

@@ -2,7 +2,7 @@
 
 #include "core/settings/VfxNameMatcher.h"
 
-#include "tests/core/ThrownResult.h"
+#include "tests/support/ThrownResult.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>

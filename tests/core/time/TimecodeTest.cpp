@@ -2,8 +2,8 @@
 
 #include "core/time/Timecode.h"
 
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -168,7 +168,6 @@ RC_GTEST_PROP(Timecode, ParseAcceptsExactlyWhatThePatternMatches, ())
 
 TEST(Timecode, ParseDoesNoRangeCheckAndIsValidTurnsTheValueDown)
 {
-    const TestProject project;
     const Timecode timecode("99:99:99:99");
 
     EXPECT_EQ(timecode.toString(), "99:99:99:99");
@@ -185,8 +184,6 @@ TEST(Timecode, PrintsEachFieldWithAtLeastTwoDigits)
 
 TEST(Timecode, IsMadeOfAWholeNumberAsFramesAndOfADoubleAsSeconds)
 {
-    const TestProject project;
-
     EXPECT_EQ(Timecode(250).toString(), "00:00:10:00");
     EXPECT_EQ(Timecode(250.0).toString(), "00:04:10:00");
     EXPECT_TRUE(Timecode(0).isInitialized());
@@ -227,8 +224,6 @@ TEST(Timecode, AnUnsetTargetOfAnAssignmentIsInitializedToo)
 
 TEST(Timecode, EverySetterInitializes)
 {
-    const TestProject project;
-
     Timecode bySet;
     bySet.set(1, 2, 3, 4);
     Timecode byFrames;
@@ -247,6 +242,7 @@ TEST(Timecode, EverySetterInitializes)
 
 TEST(Timecode, EveryOperationThatNeedsAProviderFailsWithoutOne)
 {
+    const NoProject none;
     Timecode second("00:00:01:00");
     const Timecode zero;
 
@@ -271,6 +267,7 @@ TEST(Timecode, EveryOperationThatNeedsAProviderFailsWithoutOne)
 
 TEST(Timecode, WithoutAProviderZeroIsZeroSecondsAndTheFirstOfTheDay)
 {
+    const NoProject none;
     EXPECT_EQ(Timecode().toSeconds(), 0.0);
     EXPECT_EQ(Timecode("00:00:00:00").toSeconds(), 0.0);
     EXPECT_EQ(Timecode::minTimecode().toString(), "00:00:00:00");
@@ -279,6 +276,7 @@ TEST(Timecode, WithoutAProviderZeroIsZeroSecondsAndTheFirstOfTheDay)
 
 TEST(Timecode, TheFormWithARateNeedsNoProviderAndHasNoShortcutForZero)
 {
+    const NoProject none;
     const Framerate pal(25, 0);
 
     EXPECT_EQ(Timecode("00:00:01:05").toFrameCount(pal), 30);
@@ -290,6 +288,7 @@ TEST(Timecode, TheFormWithARateNeedsNoProviderAndHasNoShortcutForZero)
 
 TEST(Timecode, TheProviderGivesTheRateAndARemovedOneGivesNone)
 {
+    const NoProject none;
     {
         const TestProject project(dropFrame30());
         EXPECT_EQ(Timecode::framerate().framesPerSecond, 30);
@@ -372,8 +371,6 @@ TEST(Timecode, TheDroppedNumbersAreRefusedAtAnyNominalRateButNotInAnUnknownState
 
 TEST(Timecode, FrameCountsAreValidFromZeroToTheLastFrame)
 {
-    const TestProject project;
-
     EXPECT_FALSE(Timecode::isValidFrameCount(-1));
     EXPECT_TRUE(Timecode::isValidFrameCount(0));
     EXPECT_TRUE(Timecode::isValidFrameCount(2159999));
@@ -386,8 +383,6 @@ TEST(Timecode, FrameCountsAreValidFromZeroToTheLastFrame)
 
 TEST(Timecode, SecondsAreValidWhenTheyRoundToAFrameOfTheDay)
 {
-    const TestProject project;
-
     // Half a frame is 0.02 s.
     EXPECT_TRUE(Timecode::isValidSeconds(-0.019));
     EXPECT_FALSE(Timecode::isValidSeconds(-0.021));
@@ -414,15 +409,12 @@ const double NoTimes[] = {std::numeric_limits<double>::quiet_NaN(),
 
 TEST(Timecode, SecondsThatAreNoNumberOrFarOutsideTheDayAreNotValid)
 {
-    const TestProject project;
-
     for (const double seconds : NoTimes)
         EXPECT_FALSE(Timecode::isValidSeconds(seconds)) << seconds;
 }
 
 TEST(Timecode, SecondsThatAreNoNumberOrFarOutsideTheDayFailWithOutOfRange)
 {
-    const TestProject project;
     const Framerate film(24, 0);
 
     for (const double seconds : NoTimes) {
@@ -438,8 +430,6 @@ TEST(Timecode, SecondsThatAreNoNumberOrFarOutsideTheDayFailWithOutOfRange)
 
 TEST(Timecode, CountsFramesOfANonDropRate)
 {
-    const TestProject project;
-
     EXPECT_EQ(Timecode("00:00:00:24").toFrameCount(), 24);
     EXPECT_EQ(Timecode("00:00:01:00").toFrameCount(), 25);
     EXPECT_EQ(Timecode("01:00:00:00").toFrameCount(), 90000);
@@ -478,8 +468,6 @@ TEST(Timecode, WritesDropFrameCounts)
 
 TEST(Timecode, AFrameNumberAboveTheRateFailsBeforeAllElse)
 {
-    const TestProject project;
-
     EXPECT_FALSE(Timecode("00:00:01:25").isValid());
     EXPECT_EQ(thrownBy([] { Timecode("00:00:01:24").toFrameCount(); }), Result::Ok);
     EXPECT_EQ(thrownBy([] { Timecode("00:00:01:25").toFrameCount(); }), Result::OutOfRange);
@@ -491,8 +479,6 @@ TEST(Timecode, AFrameNumberAboveTheRateFailsBeforeAllElse)
 
 TEST(Timecode, AFieldOutOfItsRangeHasNoFrameCount)
 {
-    const TestProject project;
-
     EXPECT_EQ(thrownBy([] { Timecode(24, 0, 0, 0).toFrameCount(); }), Result::OutOfRange);
     EXPECT_EQ(thrownBy([] { Timecode(0, 60, 0, 0).toFrameCount(); }), Result::OutOfRange);
     EXPECT_EQ(thrownBy([] { Timecode(0, 0, 60, 0).toFrameCount(); }), Result::OutOfRange);
@@ -553,7 +539,6 @@ TEST(Timecode, AnyDropFrameStateButZeroAndOneIsNotSupportedForSetting)
 
 TEST(Timecode, AFailedSetterLeavesTheValueAsItWas)
 {
-    const TestProject project;
     Timecode timecode("01:02:03:04");
     Timecode unset;
 
@@ -728,7 +713,6 @@ TEST(Timecode, RoundsAnySecondsThatFitThirtyTwoBits)
 
 TEST(Timecode, SettingSecondsRoundsToTheNearestFrame)
 {
-    const TestProject project;
     Timecode timecode;
 
     timecode.setSeconds(1.019);
@@ -762,7 +746,6 @@ TEST(Timecode, SettingSecondsUnderARateConvertsByThatRateAndTestsByTheProjects)
 
 TEST(Timecode, AddingSecondsMovesBothWaysWithinTheDay)
 {
-    const TestProject project;
     Timecode timecode("00:00:10:00");
 
     timecode.addSeconds(1.2);
@@ -784,7 +767,6 @@ TEST(Timecode, DropFrameSumsSkipTheDroppedNumbers)
 
 TEST(Timecode, ThereIsNoWrapAtMidnight)
 {
-    const TestProject project;
     const Timecode frame("00:00:00:01");
 
     EXPECT_EQ((Timecode("23:59:59:23") + frame).toString(), "23:59:59:24");
@@ -797,7 +779,6 @@ TEST(Timecode, ThereIsNoWrapAtMidnight)
 
 TEST(Timecode, AnInvalidOperandFailsOnEitherSide)
 {
-    const TestProject project;
     const Timecode second("00:00:01:00");
 
     EXPECT_EQ(thrownBy([&] { Timecode("00:00:00:26") + second; }), Result::FrameOutOfRate);
@@ -810,7 +791,6 @@ TEST(Timecode, AnInvalidOperandFailsOnEitherSide)
 
 TEST(Timecode, OfTwoInvalidOperandsTheFirstOneFails)
 {
-    const TestProject project;
     const Timecode frameAtTheRate("00:00:00:25");
     const Timecode frameAboveTheRate("00:00:00:26");
 
@@ -822,7 +802,6 @@ TEST(Timecode, OfTwoInvalidOperandsTheFirstOneFails)
 
 TEST(Timecode, ASumOfUnsetValuesIsInitializedAndItsOperandsStayAsTheyAre)
 {
-    const TestProject project;
     const Timecode unset;
     const Timecode second("00:00:01:00");
 
@@ -850,7 +829,6 @@ TEST(Timecode, ComparesFieldByFieldAsSignedNumbersWithoutAnyRate)
 
 TEST(Timecode, ConvertingKeepsTheInstantToTheNearestFrame)
 {
-    const TestProject project;
     Timecode timecode("00:00:01:12");
 
     // 1.5 s is 37.5 frames at 25, and half a frame rounds up.
@@ -890,7 +868,6 @@ TEST(Timecode, ConvertingPastTheProjectsDayFails)
 
 TEST(Timecode, ConvertingPastTheTargetsDayFails)
 {
-    const TestProject project;
     Timecode timecode("23:59:59:00");
 
     EXPECT_EQ(thrownBy([&] { timecode.convert(Framerate(24, 0), dropFrame30()); }), Result::OutOfRange);

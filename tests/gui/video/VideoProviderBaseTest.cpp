@@ -3,7 +3,7 @@
 #include "gui/video/VideoProviderBase.h"
 
 #include "core/time/Timecode.h"
-#include "tests/core/TestProject.h"
+#include "tests/support/core/TestProject.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>

@@ -2,7 +2,7 @@
 
 #include "host/border/HostFailure.h"
 
-#include "tests/core/ThrownResult.h"
+#include "tests/support/ThrownResult.h"
 #include "velmark/StringObject.h"
 
 #include <gtest/gtest.h>

@@ -3,7 +3,7 @@
 #include "host/border/NodeReading.h"
 
 #include "host/border/HostFailure.h"
-#include "tests/host/track/FakeProject.h"
+#include "tests/support/host/FakeProject.h"
 
 #include <gtest/gtest.h>
 

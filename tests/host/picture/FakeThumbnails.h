@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "tests/host/AlteredContext.h"
+#include "tests/support/host/AlteredContext.h"
 #include "velmark/Implements.h"
 #include "velmark/Media.h"
 

@@ -4,7 +4,7 @@
 
 #include "gui/video/VideoProviderBase.h"
 #include "tests/host/picture/FakeThumbnails.h"
-#include "tests/util/PlainConverter.h"
+#include "tests/support/PlainConverter.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 

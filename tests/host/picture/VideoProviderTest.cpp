@@ -4,7 +4,7 @@
 
 #include "host/border/HostFailure.h"
 #include "standin/services/ThumbnailFactory.h"
-#include "tests/host/video/VideoHost.h"
+#include "tests/support/host/VideoHost.h"
 
 #include <gtest/gtest.h>
 

@@ -4,8 +4,8 @@
 
 #include "host/border/HostFailure.h"
 #include "standin/project/MediaClip.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/ClassId.h"
 
 #include <gtest/gtest.h>

@@ -8,12 +8,13 @@
 #include "host/track/CutEvent.h"
 #include "standin/project/Envelope.h"
 #include "standin/project/Track.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/core/conform/RecordingProgress.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/NoMarkers.h"
+#include "tests/support/core/RecordingProgress.h"
+#include "tests/support/core/TestProject.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 #include "velmark/Automation.h"
 #include "velmark/String.h"
@@ -33,6 +34,7 @@ using cadrel::core::MarkerEntry;
 using cadrel::core::MarkerKind;
 using cadrel::tests::makeEvent;
 using cadrel::tests::RecordingProgress;
+using cadrel::tests::switchMarkersOff;
 using cadrel::tests::thrownBy;
 using cadrel::util::Result;
 using standin::tests::childrenOf;
@@ -86,18 +88,6 @@ protected:
     /// In the host's seconds.
     double film(double seconds) const { return 3600.0 + seconds - host.origin; }
     core::Settings& settings() { return host.adapter.model().settings(); }
-
-    void switchMarkersOff() { switchMarkersOff(host.adapter); }
-    static void switchMarkersOff(Project& project)
-    {
-        core::Settings& options = project.model().settings();
-        options.setCreateDestinationMarkers(false);
-        options.setCreateInsertMarkers(false);
-        options.setCreateDissolveWipeMarkers(false);
-        options.setCreateAutomationWarningMarkers(false);
-        options.setCreateAudioSnippetMarkers(false);
-        options.setCreateOverlapMarkers(false);
-    }
 
     TrackHost::Node addTrack(const char16_t* name) { return host.addTrack(TypeWord::Audio, name); }
     TrackHost::Node addClip(const TrackHost::Node& track, const char16_t* name, double start, double end)
@@ -269,7 +259,7 @@ TEST_P(ProjectEditsTest, TheEventsOfACutSeeWhatStandsOnTheirTracks)
 
 TEST_P(ProjectEditsTest, ACutIsCopiedToThePreview)
 {
-    switchMarkersOff();
+    switchMarkersOff(settings());
     const auto fx = addTrack(u"FX");
     addClip(fx, u"door", 8.0, 12.0);
     addClip(fx, u"steps", 13.0, 18.0);
@@ -290,7 +280,7 @@ TEST_P(ProjectEditsTest, TracksOfTheSameSourceRangeAreCopiedTogether)
     const auto edits = makeCounted<EditRecorder>();
     altered.replace(IEditService::iid, edits);
     Project project(&altered, host.document(), nullptr);
-    switchMarkersOff(project);
+    switchMarkersOff(project.model().settings());
     project.computePreviewOffset();
     const auto cut = project.makeCut(tenSeconds());
     core::Cut::CutEvents& cutEvents = cut->cutEvents();
@@ -322,7 +312,7 @@ TEST_P(ProjectEditsTest, AnEmptyOrReversedSourceIsPassedOver)
     const auto edits = makeCounted<EditRecorder>();
     altered.replace(IEditService::iid, edits);
     Project project(&altered, host.document(), nullptr);
-    switchMarkersOff(project);
+    switchMarkersOff(project.model().settings());
     project.computePreviewOffset();
     const auto cut = project.makeCut(tenSeconds());
     cut->cutEvents()[0]->setSrcIn(3620.0);
@@ -341,7 +331,7 @@ TEST_P(ProjectEditsTest, ACutFailsWithoutItsHost)
     const auto edits = makeCounted<EditRecorder>();
     edits->result = ResultFalse;
     Project project(&altered, host.document(), nullptr);
-    switchMarkersOff(project);
+    switchMarkersOff(project.model().settings());
     const auto cut = project.makeCut(tenSeconds());
     const auto processed = [&] { return thrownBy([&] { project.processCut(*host.transaction(), *cut); }); };
 
@@ -359,7 +349,7 @@ TEST_P(ProjectEditsTest, ACutFailsWithoutItsHost)
 
 TEST_P(ProjectEditsTest, ACutReportsItsProgress)
 {
-    switchMarkersOff();
+    switchMarkersOff(settings());
     addTrack(u"FX");
     addTrack(u"Music");
     RecordingProgress progress;

@@ -5,11 +5,11 @@
 #include "host/border/HostFailure.h"
 #include "host/picture/VideoProvider.h"
 #include "standin/project/Track.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
 #include "tests/host/project/AlteredDocument.h"
-#include "tests/host/track/FakeProject.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/TestProject.h"
+#include "tests/support/host/FakeProject.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>

@@ -4,9 +4,9 @@
 
 #include "standin/Application.h"
 #include "standin/services/Translations.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/host/AlteredContext.h"
 #include "velmark/UserInterface.h"
 
 #include <gtest/gtest.h>

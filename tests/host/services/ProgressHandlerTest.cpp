@@ -3,8 +3,8 @@
 #include "host/services/ProgressHandler.h"
 
 #include "standin/Application.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/host/AlteredContext.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/host/AlteredContext.h"
 #include "util/HostString.h"
 #include "velmark/StringObject.h"
 

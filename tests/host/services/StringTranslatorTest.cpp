@@ -4,8 +4,8 @@
 
 #include "standin/Application.h"
 #include "standin/services/Translations.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/host/AlteredContext.h"
 #include "util/StringUtil.h"
 #include "velmark/UserInterface.h"
 

@@ -2,8 +2,8 @@
 
 #include "host/services/Transport.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/Context.h"
 #include "velmark/Implements.h"
 

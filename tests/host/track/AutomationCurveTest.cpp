@@ -4,9 +4,9 @@
 
 #include "host/border/HostFailure.h"
 #include "host/track/TrackIndex.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/host/track/FakeProject.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/host/FakeProject.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Automation.h"
 #include "velmark/ClassId.h"
 

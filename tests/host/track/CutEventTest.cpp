@@ -5,8 +5,8 @@
 #include "host/border/HostFailure.h"
 #include "host/track/TrackIndexes.h"
 #include "standin/project/Envelope.h"
-#include "tests/host/track/FakeProject.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/host/FakeProject.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Automation.h"
 #include "velmark/Events.h"
 

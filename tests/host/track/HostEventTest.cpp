@@ -4,8 +4,8 @@
 
 #include "host/border/HostFailure.h"
 #include "standin/project/ClipEvent.h"
-#include "tests/host/track/FakeProject.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/host/FakeProject.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 #include "velmark/Media.h"
 

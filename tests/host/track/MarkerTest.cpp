@@ -3,10 +3,10 @@
 #include "host/track/Marker.h"
 
 #include "host/track/HostEvent.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/ThrownResult.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/core/TestProject.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 #include "velmark/ClassId.h"
 

@@ -3,8 +3,8 @@
 #include "host/track/Track.h"
 
 #include "host/border/HostFailure.h"
-#include "tests/host/track/FakeProject.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/host/FakeProject.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>

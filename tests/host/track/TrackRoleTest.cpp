@@ -2,7 +2,7 @@
 
 #include "host/track/TrackRole.h"
 
-#include "tests/util/PlainConverter.h"
+#include "tests/support/PlainConverter.h"
 #include "util/StringUtil.h"
 
 #include <gtest/gtest.h>

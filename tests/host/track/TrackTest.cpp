@@ -7,9 +7,9 @@
 #include "host/track/TrackIndex.h"
 #include "host/track/TrackRole.h"
 #include "standin/project/Track.h"
-#include "tests/host/track/FakeProject.h"
-#include "tests/host/track/TrackHost.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/host/FakeProject.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>

@@ -2,8 +2,8 @@
 
 #include "host/undo/DataModelChangeCommand.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/host/undo/HostedModel.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/host/HostedModel.h"
 #include "velmark/StringObject.h"
 
 #include <gtest/gtest.h>

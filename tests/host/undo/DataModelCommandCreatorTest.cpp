@@ -2,9 +2,9 @@
 
 #include "host/undo/DataModelCommandCreator.h"
 
-#include "tests/core/ThrownResult.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/host/undo/HostedModel.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/host/HostedModel.h"
 #include "velmark/Editing.h"
 
 #include <gtest/gtest.h>

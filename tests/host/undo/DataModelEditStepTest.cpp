@@ -2,7 +2,7 @@
 
 #include "host/undo/DataModelEditStep.h"
 
-#include "tests/host/undo/HostedModel.h"
+#include "tests/support/host/HostedModel.h"
 #include "velmark/Counted.h"
 
 #include <gtest/gtest.h>

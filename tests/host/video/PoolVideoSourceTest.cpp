@@ -7,8 +7,8 @@
 #include "core/time/Timecode.h"
 #include "host/project/MediaPool.h"
 #include "standin/project/MediaClip.h"
-#include "tests/core/TestProject.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/core/TestProject.h"
+#include "tests/support/standin/TestHost.h"
 
 #include <gtest/gtest.h>
 

@@ -4,7 +4,7 @@
 
 #include "host/border/HostFailure.h"
 #include "host/video/VideoTrackHandler.h"
-#include "tests/host/video/VideoHost.h"
+#include "tests/support/host/VideoHost.h"
 
 #include <gtest/gtest.h>
 

@@ -6,8 +6,8 @@
 #include "host/border/HostFailure.h"
 #include "host/video/PoolVideoSource.h"
 #include "host/video/VideoTrackHandler.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/host/video/VideoHost.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/host/VideoHost.h"
 #include "velmark/ClassId.h"
 
 #include <gtest/gtest.h>

@@ -3,8 +3,8 @@
 #include "host/video/VideoTrackHandler.h"
 
 #include "host/border/HostFailure.h"
-#include "tests/host/track/FakeProject.h"
-#include "tests/host/video/VideoHost.h"
+#include "tests/support/host/FakeProject.h"
+#include "tests/support/host/VideoHost.h"
 
 #include <gtest/gtest.h>
 

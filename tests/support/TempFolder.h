@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "tests/util/PlainConverter.h"
+#include "tests/support/PlainConverter.h"
 
 #include <algorithm>
 #include <cstdlib>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/core/conform/MemoryEngine.h"
+#include "tests/support/core/MemoryEngine.h"
 
 #include "core/cut/Cut.h"
 #include "core/cut/ProgressHandlerBase.h"

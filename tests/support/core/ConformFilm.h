@@ -4,17 +4,26 @@
 
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/conform/MemoryEngine.h"
-#include "tests/core/edl/EventMaking.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/MemoryEngine.h"
+#include "tests/support/core/NoMarkers.h"
+#include "tests/support/core/TestProject.h"
 
 #include <cstdint>
+#include <deque>
+#include <string>
 
 namespace cadrel::tests {
 
 /// A film whose tracks an engine conforms.
 struct ConformFilm {
     explicit ConformFilm(const core::Framerate& rate = core::Framerate(25, 0)) : project(rate) {}
+
+    core::EventList& oldEvents() { return model.oldEdl(); }
+    core::EventList& newEvents() { return model.newEdl(); }
+    core::Settings& settings() { return model.settings(); }
+    std::deque<MemoryTrack>& tracks() { return engine.tracks(); }
+    MemoryTrack& addTrack(const std::wstring& name, bool isAudio = true) { return engine.addTrack(name, isAudio); }
 
     /// Adds a change event, numbered from 1.
     core::EventBase& carryOver(const char* srcIn, const char* srcOut, const char* dstIn, const char* dstOut)
@@ -27,15 +36,7 @@ struct ConformFilm {
     /// Adds a change event without usable timecodes.
     void carryOverNothing() { carryOver("25:00:00:00", "26:00:00:00", "25:00:00:00", "26:00:00:00"); }
 
-    void switchMarkersOff()
-    {
-        core::Settings& settings = model.settings();
-        settings.setCreateInsertMarkers(false);
-        settings.setCreateDissolveWipeMarkers(false);
-        settings.setCreateAudioSnippetMarkers(false);
-        settings.setCreateAutomationWarningMarkers(false);
-        settings.setCreateOverlapMarkers(false);
-    }
+    void switchMarkersOff() { tests::switchMarkersOff(settings()); }
 
     /// Requests a run and lets it happen.
     util::Result::Type conform()

@@ -5,11 +5,11 @@
 #include "core/model/DataModel.h"
 #include "host/undo/DataModelEditStep.h"
 #include "standin/edit/EditService.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/model/HexBytes.h"
-#include "tests/core/notify/RecordingListener.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/HexBytes.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
+#include "tests/support/standin/TestHost.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>

@@ -5,7 +5,7 @@
 #include "core/conform/CadrelerBase.h"
 #include "core/edl/EventList.h"
 #include "core/time/SecondsRange.h"
-#include "tests/core/conform/MemoryTrack.h"
+#include "tests/support/core/MemoryTrack.h"
 
 #include <cstdint>
 #include <deque>

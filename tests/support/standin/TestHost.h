@@ -43,6 +43,10 @@ public:
     Velmark::IEditService* editService() { return m_editService.get(); }
     Velmark::IEditTransaction* transaction() { return m_transaction.get(); }
 
+    /// Gives the project 25 frames a second and a clock that begins at `origin` seconds, which aren't changes of it. Answers
+    /// `origin`.
+    double setClock(double origin);
+
     /// A track of the kind, in a folder or, with null, at the top.
     Node addTrack(const char* word, const char16_t* name, Velmark::IProjectNode* folder = nullptr);
     /// Events on a track or in a part, with times in seconds of the project.

@@ -5,8 +5,8 @@
 #include "host/track/TrackRole.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/MediaClip.h"
-#include "tests/core/TestProject.h"
-#include "tests/host/track/TrackHost.h"
+#include "tests/support/core/TestProject.h"
+#include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 #include "velmark/Events.h"
 

@@ -7,10 +7,11 @@
 #include "host/undo/DataModelEditStep.h"
 #include "standin/edit/EditService.h"
 #include "standin/project/Project.h"
-#include "tests/core/edl/EventMaking.h"
-#include "tests/core/notify/RecordingListener.h"
-#include "tests/host/AlteredContext.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/NoMarkers.h"
+#include "tests/support/core/RecordingListener.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/String.h"
 #include "velmark/UserInterface.h"
 
@@ -47,7 +48,7 @@ public:
     using Entries = std::vector<std::u16string>;
 
     /// The project's clock begins at `clockOrigin`, in seconds.
-    explicit AdaptedHost(double clockOrigin) : origin(withClock(clockOrigin))
+    explicit AdaptedHost(double clockOrigin) : origin(setClock(clockOrigin))
     {
         altered.replace(Velmark::IAlertService::iid, alerts);
         connect();
@@ -80,16 +81,7 @@ public:
         return model().changeEdl().at(number - 1);
     }
 
-    void switchMarkersOff()
-    {
-        core::Settings& options = settings();
-        options.setCreateDestinationMarkers(false);
-        options.setCreateInsertMarkers(false);
-        options.setCreateDissolveWipeMarkers(false);
-        options.setCreateAudioSnippetMarkers(false);
-        options.setCreateAutomationWarningMarkers(false);
-        options.setCreateOverlapMarkers(false);
-    }
+    void switchMarkersOff() { cadrel::tests::switchMarkersOff(settings()); }
 
     void idle() { application.idle(); }
     /// Requests a run and lets it happen.
@@ -142,14 +134,6 @@ public:
     Velmark::Counted<ReadAlerts> alerts = Velmark::makeCounted<ReadAlerts>();
 
 private:
-    double withClock(double seconds)
-    {
-        project.setFrameRate({25.0, 0});
-        project.setTimeOrigin(seconds);
-        project.clearChanges();
-        return seconds;
-    }
-
     /// To the thousandth, without zeros behind the point.
     std::string inFilm(double hostSeconds) const
     {

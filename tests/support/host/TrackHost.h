@@ -4,7 +4,7 @@
 
 #include "host/project/Project.h"
 #include "host/track/Track.h"
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/Context.h"
 #include "velmark/Implements.h"
 #include "velmark/Tracks.h"
@@ -46,22 +46,13 @@ private:
 class TrackHost : public standin::tests::TestHost {
 public:
     /// The project's clock begins at `clockOrigin`, in seconds.
-    explicit TrackHost(double clockOrigin) : origin(withClock(clockOrigin)), adapter(context(), document(), nullptr) {}
+    explicit TrackHost(double clockOrigin) : origin(setClock(clockOrigin)), adapter(context(), document(), nullptr) {}
 
     Track handle(const Node& track) { return Track(&adapter, Velmark::query<Velmark::ITrackNode>(track).get()); }
 
     const double origin;
     Project adapter;
     ChangeTeller teller{context(), adapter};
-
-private:
-    double withClock(double seconds)
-    {
-        project.setFrameRate({25.0, 0});
-        project.setTimeOrigin(seconds);
-        project.clearChanges();
-        return seconds;
-    }
 };
 
 } // namespace cadrel::host::tests

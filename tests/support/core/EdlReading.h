@@ -6,7 +6,7 @@
 #include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
 #include "core/time/Framerate.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
 #include "util/Result.h"
 
 #include <cstdint>

@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 
 #include <initializer_list>
 #include <string>

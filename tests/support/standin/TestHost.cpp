@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/standin/TestHost.h"
+#include "tests/support/standin/TestHost.h"
 
 #include "standin/ProjectManager.h"
 #include "standin/edit/EditService.h"
@@ -55,6 +55,14 @@ TestHost::TestHost()
       m_transaction(query<IEditTransaction>(m_editService))
 {
     application.activateProject(&project);
+}
+
+double TestHost::setClock(double origin)
+{
+    project.setFrameRate({25.0, 0});
+    project.setTimeOrigin(origin);
+    project.clearChanges();
+    return origin;
 }
 
 TestHost::Node TestHost::addTrack(const char* word, const char16_t* name, IProjectNode* folder)

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/standin/RandomProject.h"
+#include "tests/support/standin/RandomProject.h"
 
 #include "standin/file/ProjectKeys.h"
 #include "standin/project/AttributeList.h"

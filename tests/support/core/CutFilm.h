@@ -7,17 +7,14 @@
 #include "core/cut/CutList.h"
 #include "core/detect/CadrelInformationAlgorithm.h"
 #include "core/edl/EventBase.h"
-#include "core/edl/EventList.h"
-#include "core/settings/Settings.h"
-#include "tests/core/TestProject.h"
-#include "tests/core/conform/MemoryTrack.h"
-#include "tests/core/edl/EventMaking.h"
+#include "tests/support/core/ConformFilm.h"
+#include "tests/support/core/EventMaking.h"
+#include "tests/support/core/MemoryTrack.h"
 
 #include <gtest/gtest.h>
 
 #include <cstddef>
 #include <cstdint>
-#include <deque>
 #include <memory>
 #include <ostream>
 #include <string>
@@ -36,11 +33,9 @@ inline void PrintTo(const MarkerEntry& entry, std::ostream* out)
 
 namespace cadrel::tests {
 
-/// A film in conform: its EDLs, its tracks and its cuts.
-struct CutFilm {
-    explicit CutFilm(const core::Framerate& rate = core::Framerate(25, 0)) : project(rate) {}
-
-    MemoryTrack& addTrack(const std::wstring& name, bool isAudio = true) { return tracks.emplace_back(name, isAudio); }
+/// A film whose cuts are handed to one algorithm at a time, without a run of the engine.
+struct CutFilm : ConformFilm {
+    using ConformFilm::ConformFilm;
 
     /// Adds a cut whose change event has a place in the new programme; where it comes from doesn't matter to anyone.
     core::EventBase& carryOver(const char* dstIn, const char* dstOut, core::Cut::CutEvents cutEvents = {})
@@ -52,8 +47,11 @@ struct CutFilm {
     /// Adds a cut of which the cut events alone matter.
     void addCut(core::Cut::CutEvents cutEvents) { carryOver("01:00:00:00", "01:00:10:00", std::move(cutEvents)); }
 
-    core::CadrelRunState runState() const { return {&oldEvents, &newEvents, project.framerate, &settings, 0.0}; }
-    core::CadrelPreviewState previewState() const { return {project.framerate, &settings}; }
+    core::CadrelRunState runState() const
+    {
+        return {&model.oldEdl(), &model.newEdl(), project.framerate, &model.settings(), 0.0};
+    }
+    core::CadrelPreviewState previewState() const { return {project.framerate, &model.settings()}; }
 
     std::vector<core::MarkerEntry> detectBy(const core::CadrelInformationAlgorithm& algorithm,
                                             core::ProgressHandlerBase* progress = nullptr) const
@@ -61,12 +59,7 @@ struct CutFilm {
         return algorithm.detect(cuts, runState(), progress);
     }
 
-    TestProject project;
-    core::EventList oldEvents{core::ListKind::Old};
-    core::EventList newEvents{core::ListKind::New};
-    std::deque<MemoryTrack> tracks;
     core::CutList cuts;
-    core::Settings settings;
 };
 
 inline std::shared_ptr<core::CutEventBase> cutEvent(MemoryTrack& track, core::SecondsRange source,

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/core/conform/MemoryTrack.h"
+#include "tests/support/core/MemoryTrack.h"
 
 #include "util/Result.h"
 
