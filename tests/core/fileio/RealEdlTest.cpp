@@ -4,9 +4,11 @@
 #include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
 #include "core/time/Framerate.h"
+#include "core/time/Timecode.h"
 #include "tests/support/TreePaths.h"
 #include "tests/support/core/EdlReading.h"
 #include "tests/support/core/TestProject.h"
+#include "tests/support/core/TreeEdls.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>
@@ -18,7 +20,9 @@
 #include <iostream>
 #include <map>
 #include <set>
+#include <stdexcept>
 #include <string>
+#include <vector>
 
 namespace cadrel::tests {
 namespace {
@@ -29,6 +33,7 @@ using core::EventBase;
 using core::EventFlaw;
 using core::EventList;
 using core::Framerate;
+using core::Timecode;
 using core::TransitionType;
 using core::fileio::CmxParser;
 using util::Result;
@@ -162,6 +167,37 @@ TEST(RealEdl, EachFileShowsItsRateWithoutAProject)
         EXPECT_EQ(shown(framerate), content.rate) << content.file;
     }
     util::StringUtil::setConverter(nullptr);
+}
+
+TEST(RealEdl, EveryFileWithPictureIsAnEdlOfTheTree)
+{
+    std::vector<std::string> paths{"examples/reel3/reel3_v07.edl", "examples/reel3/reel3_v12.edl"};
+    for (const Content& content : Contents) {
+        if (content.file.ends_with(".edl"))
+            paths.push_back("tests/data/edl/" + std::string(content.file));
+    }
+
+    EXPECT_EQ(treeEdls(), paths);
+}
+
+TEST(RealEdl, AnEdlOfTheTreeIsReadUnderTheRateThatItShows)
+{
+    for (const Content& content : Contents) {
+        SCOPED_TRACE(content.file);
+        const TreeEdl edl("tests/data/edl/" + std::string(content.file));
+
+        EXPECT_EQ(Timecode::framerate().framesPerSecond, content.rate.framesPerSecond);
+        EXPECT_EQ(Timecode::framerate().dropFrame, 0);
+        EXPECT_EQ(edl.framerate().framesPerSecond, content.rate.framesPerSecond);
+        EXPECT_EQ(countOf(edl.events(), TransitionType::Cut), content.cuts);
+        EXPECT_EQ(flawCountsOf(edl.events()), flawCounts(content.withoutVideo, content.reversed));
+    }
+}
+
+TEST(RealEdl, AnEdlThatIsNotInTheTreeCannotBeRead)
+{
+    EXPECT_THROW(TreeEdl("tests/data/edl/none.edl"), std::runtime_error);
+    EXPECT_EQ(Timecode::framerate().framesPerSecond, 25) << "The project from before is open again.";
 }
 
 } // namespace
