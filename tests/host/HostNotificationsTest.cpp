@@ -43,6 +43,9 @@ using Types = std::vector<std::int32_t>;
 using Models = std::vector<core::DataModel*>;
 using Messages = std::vector<std::u16string>;
 
+constexpr const char16_t* SaveFailed = u"An error occurred while saving the Cadrel data.";
+constexpr const char16_t* LoadFailed = u"An error occurred while loading the Cadrel data. The data will be ignored.";
+
 /// The adapter, and who listens to it.
 class HostNotificationsTest : public testing::Test {
 protected:
@@ -348,7 +351,7 @@ TEST_F(HostNotificationsTest, SaysThatASaveWentWrong)
 
     EXPECT_NE(host.adapter().projectStoring(host.document()), ResultOk);
 
-    EXPECT_EQ(host.alerts->messages, Messages{u"An error occurred while saving the Cadrel data."});
+    EXPECT_EQ(host.alerts->messages, Messages{SaveFailed});
 }
 
 TEST_F(HostNotificationsTest, LeavesNothingStoredWhereTheHostTakesNoBlock)
@@ -362,7 +365,7 @@ TEST_F(HostNotificationsTest, LeavesNothingStoredWhereTheHostTakesNoBlock)
 
     EXPECT_NE(host.project.hasAttribute(AttributeKey::Storage), ResultOk);
     EXPECT_NE(host.project.hasAttribute(AttributeKey::StorageChecksum), ResultOk);
-    EXPECT_EQ(host.alerts->messages, Messages{u"An error occurred while saving the Cadrel data."});
+    EXPECT_EQ(host.alerts->messages, Messages{SaveFailed});
 }
 
 TEST_F(HostNotificationsTest, StoresAProjectAtItsOwnRateWhileAnotherIsActive)
@@ -398,7 +401,7 @@ TEST_F(HostNotificationsTest, SaysThatAProjectThatItDoesNotKnowWasNotSaved)
 
     EXPECT_EQ(host.adapter().projectStoring(stranger.get()), Result::HostObjectMissing);
 
-    EXPECT_EQ(host.alerts->messages, Messages{u"An error occurred while saving the Cadrel data."});
+    EXPECT_EQ(host.alerts->messages, Messages{SaveFailed});
 }
 
 TEST_F(HostNotificationsTest, SaysThatANewerVersionCannotBeLoaded)
@@ -432,8 +435,7 @@ TEST_F(HostNotificationsTest, SaysThatBrokenDataAreIgnored)
 
     reopen(host.project);
 
-    EXPECT_EQ(host.alerts->messages,
-              Messages{u"An error occurred while loading the Cadrel data. The data will be ignored."});
+    EXPECT_EQ(host.alerts->messages, Messages{LoadFailed});
 }
 
 TEST_F(HostNotificationsTest, SaysThatDataAreIgnoredWhichTheHostDoesNotGive)
@@ -446,9 +448,7 @@ TEST_F(HostNotificationsTest, SaysThatDataAreIgnoredWhichTheHostDoesNotGive)
     host.project.setAttribute(AttributeKey::Storage, FVariant::object(empty.get()), true);
     reopen(host.project);
 
-    EXPECT_EQ(host.alerts->messages,
-              (Messages{u"An error occurred while loading the Cadrel data. The data will be ignored.",
-                        u"An error occurred while loading the Cadrel data. The data will be ignored."}));
+    EXPECT_EQ(host.alerts->messages, (Messages{LoadFailed, LoadFailed}));
     EXPECT_TRUE(host.model().changeEdl().isEmpty());
 }
 

@@ -206,10 +206,11 @@ TEST(MemoryEngine, ShowsTheProgressOfARunUnderItsTitleAndLetsItBeCancelled)
 
     EXPECT_EQ(film.conform(), Result::Ok);
 
-    // Two events on two tracks, and a step for each event to find overlaps.
-    EXPECT_EQ(progress.calls, (std::vector<std::wstring>{L"start Processing Project 6 can cancel", L"cancelled?",
-                                                         L"tick 2", L"cancelled?", L"tick 2", L"text Overlap Markers",
-                                                         L"tick 1", L"cancelled?", L"finish"}));
+    // Two events on two tracks, and a step for each event to find overlaps, of which there is one less.
+    EXPECT_EQ(progress.calls.front(), L"start Processing Project 6 can cancel");
+    EXPECT_EQ(progress.texts, std::vector<std::wstring>{L"Overlap Markers"});
+    EXPECT_EQ(progress.steps(), 5U);
+    EXPECT_EQ(progress.calls.back(), L"finish");
 }
 
 TEST(MemoryEngine, ShowsTheProgressOfAPreviewUnderItsTitle)
@@ -221,8 +222,9 @@ TEST(MemoryEngine, ShowsTheProgressOfAPreviewUnderItsTitle)
 
     EXPECT_EQ(film.engine.onIdle(), Result::Ok);
 
-    EXPECT_EQ(progress.calls,
-              (std::vector<std::wstring>{L"start Project Preview 1", L"cancelled?", L"tick 1", L"finish"}));
+    EXPECT_EQ(progress.calls.front(), L"start Project Preview 1");
+    EXPECT_EQ(progress.steps(), 1U);
+    EXPECT_EQ(progress.calls.back(), L"finish");
 }
 
 TEST(MemoryEngine, LeavesOutWhatWouldStandBeforeTheProgrammeAndWhatRunsBackwards)

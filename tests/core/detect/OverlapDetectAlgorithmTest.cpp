@@ -248,7 +248,7 @@ TEST(OverlapDetectAlgorithm, OverlapThatEndsBeforeZeroIsMarkedUpToZero)
     EXPECT_EQ(film.detect(), Entries{overlapInDialogue(-12.0, 0.0)});
 }
 
-TEST(OverlapDetectAlgorithm, ReportsAStepForEachPairAndAsksForCancelBehindEach)
+TEST(OverlapDetectAlgorithm, ReportsAStepForEachPairAndMayBeCancelledAfterEach)
 {
     OverlapFilm film;
     MemoryTrack& music = film.addTrack(L"Music");
@@ -257,9 +257,14 @@ TEST(OverlapDetectAlgorithm, ReportsAStepForEachPairAndAsksForCancelBehindEach)
                      cutEvent(music, {100.0, 110.0}, {start, start + 10.0})});
     }
     RecordingProgress progress;
-
     EXPECT_EQ(film.detect(&progress), Entries{});
-    EXPECT_EQ(progress.calls, (std::vector<std::wstring>{L"tick 1", L"cancelled?", L"tick 1", L"cancelled?"}));
+    EXPECT_EQ(progress.steps(), 2U);
+
+    for (const std::size_t pairs : {1U, 2U}) {
+        RecordingProgress cancelled(pairs);
+        EXPECT_EQ(thrownBy([&] { film.detect(&cancelled); }), Result::Cancelled);
+        EXPECT_EQ(cancelled.steps(), pairs);
+    }
 }
 
 TEST(OverlapDetectAlgorithm, FindsTheSameWithAProgressAndWithout)
@@ -270,7 +275,6 @@ TEST(OverlapDetectAlgorithm, FindsTheSameWithAProgressAndWithout)
     RecordingProgress progress;
 
     EXPECT_EQ(film.detect(&progress), film.detect(nullptr));
-    EXPECT_EQ(progress.calls, (std::vector<std::wstring>{L"tick 1", L"cancelled?"}));
 }
 
 TEST(OverlapDetectAlgorithm, StopsAsSoonAsTheUserCancels)
@@ -282,7 +286,7 @@ TEST(OverlapDetectAlgorithm, StopsAsSoonAsTheUserCancels)
     RecordingProgress progress(1);
 
     EXPECT_EQ(thrownBy([&] { film.detect(&progress); }), Result::Cancelled);
-    EXPECT_EQ(progress.calls, (std::vector<std::wstring>{L"tick 1", L"cancelled?"}));
+    EXPECT_EQ(progress.steps(), 1U);
 }
 
 TEST(OverlapDetectAlgorithm, WithoutTwoCutsThereIsNothingToReport)
@@ -294,7 +298,7 @@ TEST(OverlapDetectAlgorithm, WithoutTwoCutsThereIsNothingToReport)
     EXPECT_EQ(film.detect(&cancelled), Entries{});
     film.addCut({cutEvent(film.dialogue, {100.0, 110.0}, {200.0, 210.0})});
     EXPECT_EQ(film.detect(&cancelled), Entries{});
-    EXPECT_TRUE(cancelled.calls.empty());
+    EXPECT_EQ(cancelled.steps(), 0U);
 }
 
 TEST(OverlapDetectAlgorithm, CutWithoutCutEventsIsOutOfRange)

@@ -357,7 +357,8 @@ TEST_P(ProjectEditsTest, ACutReportsItsProgress)
 
     process(*host.adapter.makeCut(tenSeconds()));
 
-    EXPECT_EQ(progress.calls, (std::vector<std::wstring>{L"text Event: 7 - A012 ", L"tick 2"}));
+    EXPECT_EQ(progress.texts, std::vector<std::wstring>{L"Event: 7 - A012 "});
+    EXPECT_EQ(progress.steps(), 2U);
 }
 
 TEST_P(ProjectEditsTest, MarksTheDestinationWithTheReel)
@@ -450,7 +451,7 @@ TEST_P(ProjectEditsTest, WritesEachMarkerOnTheTrackOfItsKind)
     const auto marker = childrenOf(*markerTrack(u"Insert")).front();
     EXPECT_EQ(textOf(marker, AttributeKey::Reel), "");
     EXPECT_NE(marker->hasAttribute(AttributeKey::EventUserId), ResultOk);
-    EXPECT_EQ(progress.ticks, (std::vector<std::uint64_t>{1, 1, 1, 1, 1}));
+    EXPECT_EQ(progress.steps(), 5U);
 }
 
 TEST_P(ProjectEditsTest, AMarkerOfAHundredthOfASecondIsAPoint)
@@ -481,7 +482,7 @@ TEST_P(ProjectEditsTest, AMarkerWithoutATrackIsPassedOver)
         Result::Ok);
 
     EXPECT_EQ(contentOf(markerTrack(u"Overlap")), Content{"preview: Twice 5-6"});
-    EXPECT_EQ(progress.ticks, std::vector<std::uint64_t>{1});
+    EXPECT_EQ(progress.steps(), 1U);
 }
 
 TEST_P(ProjectEditsTest, AMarkerOfNoKindFailsAndThoseBeforeItStay)

@@ -97,10 +97,4 @@ inline void expectEntries(const std::vector<core::MarkerEntry>& found, const std
     }
 }
 
-/// The calls of a progress that is told so many single steps and asked nothing.
-inline std::vector<std::wstring> singleTicks(std::size_t count)
-{
-    return std::vector<std::wstring>(count, L"tick 1");
-}
-
 } // namespace cadrel::tests
