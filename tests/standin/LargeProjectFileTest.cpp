@@ -3,7 +3,7 @@
 // What the file of a large project costs. A step that is quadratic in clips would take sixteen times as long for four times
 // as many.
 
-#include "tests/support/standin/ProjectText.h"
+#include "tests/standin/ProjectText.h"
 
 #include <gtest/gtest.h>
 

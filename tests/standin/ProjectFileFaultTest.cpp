@@ -5,9 +5,9 @@
 #include "standin/file/ProjectFile.h"
 
 #include "standin/project/Project.h"
+#include "tests/standin/ProjectText.h"
 #include "tests/support/NoPrivileges.h"
 #include "tests/support/TempFolder.h"
-#include "tests/support/standin/ProjectText.h"
 
 #include <gtest/gtest.h>
 

@@ -9,7 +9,7 @@
 #include "standin/project/Envelope.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Track.h"
-#include "tests/support/standin/ProjectText.h"
+#include "tests/standin/ProjectText.h"
 #include "tests/support/standin/RandomProject.h"
 
 #include <gtest/gtest.h>

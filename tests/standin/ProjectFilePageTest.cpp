@@ -3,9 +3,9 @@
 // The page that describes the project file.
 
 #include "standin/file/ProjectKeys.h"
+#include "tests/standin/ProjectText.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/TreePaths.h"
-#include "tests/support/standin/ProjectText.h"
 
 #include <gtest/gtest.h>
 

@@ -8,7 +8,7 @@
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
 #include "standin/project/Track.h"
-#include "tests/support/standin/ProjectText.h"
+#include "tests/standin/ProjectText.h"
 
 #include <gtest/gtest.h>
 

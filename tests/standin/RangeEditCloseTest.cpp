@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "tests/support/standin/RangeEditHost.h"
+#include "tests/standin/RangeEditHost.h"
 
 #include <gtest/gtest.h>
 

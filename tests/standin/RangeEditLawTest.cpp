@@ -7,9 +7,9 @@
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
 #include "standin/project/Track.h"
+#include "tests/standin/RangeEditHost.h"
 #include "tests/support/standin/Heard.h"
 #include "tests/support/standin/RandomProject.h"
-#include "tests/support/standin/RangeEditHost.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
