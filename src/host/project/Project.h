@@ -13,6 +13,7 @@
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
 #include "host/track/TrackIndexes.h"
+#include "host/track/TrackProject.h"
 #include "host/track/TrackRole.h"
 #include "util/ListenerSet.h"
 #include "velmark/Counted.h"
@@ -58,7 +59,7 @@ class VideoProvider;
 ///
 /// Failures are thrown as Result::Type: HostObjectMissing, HostCallFailed, and NotAvailable where an operation needs the
 /// preview offset or a live track and has none.
-class Project final : public core::FramerateProvider {
+class Project final : public core::FramerateProvider, public TrackProject {
 public:
     /// The preview offset of a project that has none.
     static constexpr double NoPreviewOffset = std::numeric_limits<double>::lowest();
@@ -70,7 +71,7 @@ public:
     ~Project();
 
     Velmark::IProjectDocument* document() const { return m_document; }
-    Velmark::IHostContext* hostContext() const { return m_hostContext; }
+    Velmark::IHostContext* hostContext() const override { return m_hostContext; }
     core::DataModel& model() { return m_model; }
     MediaPool& mediaPool() { return m_mediaPool; }
 
@@ -99,13 +100,12 @@ public:
     /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
     /// alone, in which nobody else edits.
     void setUseTrackCache(bool flag);
-    bool isTrackAlive(const Velmark::ITrackNode* track);
-    /// The context of an object's times; null gives the root's.
-    Velmark::Counted<Velmark::FUnknown> containerOf(Velmark::FUnknown* object);
+    bool isTrackAlive(const Velmark::ITrackNode* track) override;
+    Velmark::Counted<Velmark::FUnknown> containerOf(Velmark::FUnknown* object) override;
 
     // Times.
 
-    double timeOrigin() const;
+    double timeOrigin() const override;
     double projectEnd() const;
     bool hasPreviewOffset() const;
     /// NoPreviewOffset when there is none.
@@ -171,9 +171,8 @@ public:
     void onProjectChanged();
     /// The same: lets the memos follow their copies in the preview, and tells all listeners.
     void onProjectEdited(Velmark::IEditTransaction& transaction);
-    /// Not owned.
-    void addListener(ProjectListener* listener) { m_listeners.add(listener); }
-    void removeListener(ProjectListener* listener) { m_listeners.remove(listener); }
+    void addListener(ProjectListener* listener) override { m_listeners.add(listener); }
+    void removeListener(ProjectListener* listener) override { m_listeners.remove(listener); }
 
 private:
     void readModel();
@@ -191,6 +190,7 @@ private:
     Velmark::IParameter& locator(const char* name) const;
     void tellListeners(FirstFailure& failure);
     bool isPreviewing() const;
+    MemoSync::Previewed previewed() const;
     void syncMemos(Velmark::IEditTransaction& transaction);
     void rememberMemos();
 
@@ -234,7 +234,7 @@ private:
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;
     TrackIndexes m_indexes; ///< cleared by each edit
-    MemoSync m_memoSync{*this};
+    MemoSync m_memoSync;
 };
 
 } // namespace cadrel::host
