@@ -113,7 +113,7 @@ void Host::open(IProjectDocument* document)
     entry.registration.add([this, document] { document->removeStorageNotification(this); });
     requireOk(dependencies->addDependent(document, this));
     entry.registration.add([this, document, dependencies] { dependencies->removeDependent(document, this); });
-    entry.project = std::make_unique<Project>(m_context.get(), document, m_videoProvider.get());
+    entry.project = std::make_unique<Project>(m_context.get(), document);
     Project& project = *entry.project;
     m_projects.emplace(document, std::move(entry));
     // A project whose data can't be read stays, with an empty model.

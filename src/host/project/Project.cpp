@@ -46,9 +46,9 @@ bool areSame(const core::Framerate& a, const core::Framerate& b)
 
 } // namespace
 
-Project::Project(IHostContext* context, IProjectDocument* document, VideoProvider* videoProvider)
-    : m_document(required(document)), m_mediaPool(context, document->getMediaPool()), m_videoProvider(videoProvider),
-      m_hostContext(context), m_memoSync(context)
+Project::Project(IHostContext* context, IProjectDocument* document)
+    : m_document(required(document)), m_mediaPool(context, document->getMediaPool()), m_hostContext(context),
+      m_memoSync(context)
 {
 }
 

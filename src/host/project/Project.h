@@ -45,7 +45,6 @@ class ProgressHandlerBase;
 namespace cadrel::host {
 
 class FirstFailure;
-class VideoProvider;
 
 /// One project of the host: it owns the model that belongs to it, finds and makes the tracks on which the system writes, and
 /// does to the host's tracks what the engine decides.
@@ -64,8 +63,8 @@ public:
     /// The preview offset of a project that has none.
     static constexpr double NoPreviewOffset = std::numeric_limits<double>::lowest();
 
-    /// None of them is owned. The document outlives the project; the provider may be null.
-    Project(Velmark::IHostContext* context, Velmark::IProjectDocument* document, VideoProvider* videoProvider);
+    /// Neither is owned. The document outlives the project.
+    Project(Velmark::IHostContext* context, Velmark::IProjectDocument* document);
     Project(const Project&) = delete;
     Project& operator=(const Project&) = delete;
     ~Project();
@@ -124,10 +123,10 @@ public:
     /// Finds or makes the folder and the tracks of the markers that are switched on, and gives every memo a user id
     /// of its own.
     void createMarkerTracks(Velmark::IEditTransaction& transaction);
-    /// Finds or makes the track of the new picture; does nothing without new videos.
+    /// Finds or makes the track of the new picture, which its role alone tells; does nothing without new videos.
     void createVideoTracks(Velmark::IEditTransaction& transaction);
     /// Locks or unlocks what collectLockTracks has found, the track of the new picture and the marker tracks but the
-    /// memos'. Carries out all, and throws the first failure at the end.
+    /// memos'. What the user has locked himself stays as it is. Carries out all, and throws the first failure at the end.
     void setTracksLocked(bool lock);
     /// The tracks that a run would change and that the user hasn't locked.
     void collectLockTracks();
@@ -145,7 +144,7 @@ public:
     /// Brings the preview stretch back over the real programme. A restricted run clears the preview too, also where its
     /// range is empty and nothing is brought back.
     void completeApply(Velmark::IEditTransaction& transaction);
-    /// Writes each on the track of its kind, and none whose track isn't there. Throws Result::InvalidArgument for an entry
+    /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws Result::InvalidArgument for an entry
     /// whose kind is none of MarkerKind; earlier ones stay written.
     void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
     /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what
@@ -197,7 +196,10 @@ private:
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
     bool isMarkerTrack(const Track& track) const;
+    /// By its role; an empty handle without one.
     Track newVideoTrack();
+    /// Whether markers can be written there. On a track that the user has locked they would stay in the preview stretch.
+    static bool takesMarkers(const Track& track) { return track.isAlive() && !track.hostLocked(); }
     /// Puts a track of that role into the slot unless the one there is alive. False when there is none.
     bool findTrack(Track& slot, const char* word, std::int32_t role);
     void findOrCreateTrack(Velmark::IEditTransaction& transaction, Track& slot, const char* word, std::int32_t role);
@@ -221,7 +223,6 @@ private:
     util::ListenerSet<ProjectListener> m_listeners; ///< before all tracks, which are among them
     Velmark::IProjectDocument* m_document;
     MediaPool m_mediaPool;
-    VideoProvider* m_videoProvider;
     std::array<Track, TrackRole::LastMarker> m_markerTracks; ///< by role, less one
     Track m_folderTrack;
     /// Nothing while it isn't in use, and until it's filled.

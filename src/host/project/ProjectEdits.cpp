@@ -187,7 +187,8 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
             copyRange(group.tracks, group.source.start, group.source.end, group.destination + offset);
     }
     tick(cut.cutEvents().size());
-    if (m_model.settings().createDestinationMarkers())
+    const Track& destinations = markerTrack(TrackRole::Destination);
+    if (m_model.settings().createDestinationMarkers() && !(destinations.isAlive() && destinations.hostLocked()))
         writeDestinationMarker(transaction, event);
 }
 
@@ -207,7 +208,7 @@ void Project::generateMarkers(IEditTransaction& transaction, const std::vector<c
     m_indexes.clear();
     for (const core::MarkerEntry& entry : entries) {
         const Track& track = markerTrack(roleOf(entry.kind));
-        if (!track.isAlive())
+        if (!takesMarkers(track))
             continue;
         Marker{entry.start + offset, entry.end + offset, StringUtil::toWide(hostText(entry.name)), {}}.insertInto(
             m_hostContext, transaction, track);

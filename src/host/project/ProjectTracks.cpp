@@ -3,7 +3,6 @@
 #include "core/settings/Settings.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
-#include "host/picture/VideoProvider.h"
 #include "host/project/Project.h"
 #include "velmark/Editing.h"
 
@@ -42,14 +41,14 @@ void Project::createVideoTracks(IEditTransaction& transaction)
 {
     if (m_model.videoList().isEmpty())
         return;
-    Track video = newVideoTrack();
+    Track video;
     findOrCreateTrack(transaction, video, TypeWord::Video, TrackRole::NewVideo);
 }
 
 void Project::setTracksLocked(bool lock)
 {
     const auto setLock = [lock](Track& track) {
-        if (track.isAlive())
+        if (track.isAlive() && (track.hasLockState() || (lock && !track.hostLocked())))
             track.setLock(lock);
     };
     FirstFailure failure;
@@ -65,7 +64,6 @@ void Project::setTracksLocked(bool lock)
     }
     failure.ofStep([&] {
         Track video = newVideoTrack();
-        findTrack(video, TypeWord::Video, TrackRole::NewVideo);
         setLock(video);
     });
     failure.raise();
@@ -97,7 +95,9 @@ bool Project::isMarkerTrack(const Track& track) const
 
 Track Project::newVideoTrack()
 {
-    return m_videoProvider ? m_videoProvider->getTrackHandler().trackFor(VideoTrackHandler::Mode::New, true) : Track();
+    Track video;
+    findTrack(video, TypeWord::Video, TrackRole::NewVideo);
+    return video;
 }
 
 bool Project::isMarkerRoleOn(std::int32_t role) const
