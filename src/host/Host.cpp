@@ -8,11 +8,11 @@
 #include "core/time/Timecode.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
-#include "host/picture/VideoProvider.h"
 #include "host/project/FramerateScope.h"
 #include "host/project/Project.h"
 #include "host/services/AlertWindow.h"
 #include "host/services/FileBrowserDialog.h"
+#include "host/video/ProjectVideo.h"
 #include "util/StringUtil.h"
 
 #include <utility>
@@ -38,12 +38,12 @@ std::wstring loadingAlert(Result::Type failure)
 
 } // namespace
 
-Host::Host(FUnknown* context)
+Host::Host(FUnknown* context, std::shared_ptr<ProjectVideo> video)
     : m_context(required(query<IHostContext>(context))),
       m_projectManager(required(service<IProjectManager>(m_context))),
       m_serviceContext(required(query<IHostContext>(context))), m_transport(service<ITransportControl>(m_context)),
       m_translator(std::make_shared<StringTranslator>(m_context.get())),
-      m_videoProvider(std::make_shared<VideoProvider>(m_context.get()))
+      m_videoProvider(video ? std::move(video) : std::make_shared<ProjectVideo>(m_context.get()))
 {
     registerWithHost();
     for (int32 index = 0; index < m_projectManager->projectCount(); ++index) {

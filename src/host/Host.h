@@ -31,7 +31,7 @@ class IActionManager;
 namespace cadrel::host {
 
 class Project;
-class VideoProvider;
+class ProjectVideo;
 
 /// The one object through which the engine and the window reach the host. It keeps a Project for each project that is open
 /// there, follows which one is active, and carries out what the engine asks for on that one.
@@ -60,14 +60,16 @@ public:
     /// and catches up with the projects that are open. Throws Result::HostObjectMissing when the host has no context, no
     /// project manager or no idle calls, and Result::NotAvailable when the process has alerts or file boxes already;
     /// nothing stays registered then.
-    explicit Host(Velmark::FUnknown* context);
+    ///
+    /// `video` is given by who shows its pictures; without one the videos are written and none is shown.
+    explicit Host(Velmark::FUnknown* context, std::shared_ptr<ProjectVideo> video = nullptr);
     Host(const Host&) = delete;
     Host& operator=(const Host&) = delete;
     ~Host() override;
 
     /// The active project's; null without one.
     core::DataModel* getProjectModel();
-    const std::shared_ptr<VideoProvider>& getVideoProvider() const { return m_videoProvider; }
+    const std::shared_ptr<ProjectVideo>& getVideoProvider() const { return m_videoProvider; }
 
     // What the host tells.
 
@@ -194,8 +196,8 @@ private:
     Velmark::Counted<Velmark::IHostContext> m_serviceContext;
     Transport m_transport;
     std::shared_ptr<StringTranslator> m_translator;
-    std::shared_ptr<VideoProvider> m_videoProvider;
-    bool m_processing = false; ///< from the begin of a transaction to the end of its commit
+    std::shared_ptr<ProjectVideo> m_videoProvider; ///< never null
+    bool m_processing = false;                     ///< from the begin of a transaction to the end of its commit
     bool m_runRequested = false;
     bool m_previewRequested = false;
     core::EventList m_previewEvents{core::ListKind::Change};

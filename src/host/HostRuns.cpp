@@ -8,11 +8,11 @@
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
-#include "host/picture/VideoProvider.h"
 #include "host/project/Project.h"
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
 #include "host/undo/PreviewEventsStep.h"
+#include "host/video/ProjectVideo.h"
 #include "util/StringUtil.h"
 #include "velmark/UserInterface.h"
 
