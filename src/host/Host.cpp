@@ -134,8 +134,9 @@ void Host::setCurrentProject(Project* project)
 {
     // Nothing is left behind half: the window follows whatever fails.
     FirstFailure failure;
+    std::vector<std::int32_t> dropped;
     if (m_currentProject != project) {
-        clearRequests();
+        dropped = dropRequests();
         m_restorePreviewState = false;
     }
     if (m_currentProject)
@@ -148,13 +149,8 @@ void Host::setCurrentProject(Project* project)
     }
     failure.ofStep([&] { m_videoProvider->setProject(project); });
     failure.ofStep([&] { notify(core::DataModelChangeContext(getProjectModel())); });
+    tellDropped(dropped);
     failure.raise();
-}
-
-void Host::clearRequests()
-{
-    m_runRequested = false;
-    m_previewRequested = false;
 }
 
 int32 Host::projectClosing(IProjectDocument* project, int32 /*reserved*/)

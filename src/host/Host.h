@@ -23,6 +23,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace Velmark {
 class IActionManager;
@@ -42,7 +43,8 @@ class ProjectVideo;
 ///     onIdle()          progress > transaction > model command > run > commit under "Apply Cadrel"
 ///
 /// While such a transaction is open, what the host tells of edits is ignored. A run that fails keeps what it has done, under
-/// "Apply Cadrel (incomplete)"; one that the user cancels is undone.
+/// "Apply Cadrel (incomplete)"; one that the user cancels is undone. How each request ended the listeners hear in an
+/// ActionChangeContext, also of one that is dropped because the project is left or the preview ends.
 ///
 /// Cycles, locators and positions are seconds from the time origin, as the host has them; all other times are seconds of
 /// the project's clock. What is asked without an active project does nothing and answers Result::Ok, an empty result or
@@ -161,11 +163,16 @@ private:
     /// Null for what isn't registered.
     Project* find(Velmark::IProjectDocument* document) const;
     void setCurrentProject(Project* project);
-    void clearRequests();
     void settleAfterUndo(Project& project);
     static void showAlert(const std::wstring& message);
 
     // Runs and previews, in HostRuns.cpp.
+    /// Carries out what was requested and tells how it ended.
+    void serve(std::int32_t action, bool& request, const std::function<util::Result::Type()>& job);
+    /// Lowers the requests, and answers the actions that never begin for it.
+    std::vector<std::int32_t> dropRequests();
+    void tellDropped(const std::vector<std::int32_t>& actions);
+    /// Result::Cancelled when the user has cancelled it and it was taken back.
     util::Result::Type runCadrel();
     util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                   std::uint32_t options);
@@ -200,6 +207,7 @@ private:
     bool m_processing = false;                     ///< from the begin of a transaction to the end of its commit
     bool m_runRequested = false;
     bool m_previewRequested = false;
+    std::optional<std::int32_t> m_served; ///< the action of the request that is being carried out
     core::EventList m_previewEvents{core::ListKind::Change};
     std::uint64_t m_previewFirst = 0;
     std::uint64_t m_previewLast = 0;
