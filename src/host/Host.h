@@ -117,6 +117,7 @@ public:
     // The steps of a run. Those that edit throw Result::NotAvailable when no transaction is open.
 
     util::Result::Type canStart() override;
+    /// Clears the preview: frees the tracks that the system holds locked and empties the preview stretch.
     util::Result::Type removeVirginTerritoryMarkers() override;
     util::Result::Type processEvent(core::Cut& cut) override;
     std::shared_ptr<core::Cut> makeCutEvents(const std::shared_ptr<core::EventBase>& changeEvent) override;
@@ -124,7 +125,9 @@ public:
     util::Result::Type generateMarkers(const std::vector<core::MarkerEntry>& entries) override;
     core::CadrelRunState getRunState() override;
     core::CadrelPreviewState getPreviewState() override;
+    /// Applies the cuts and then, where the settings ask for it, leads the automation over the stretches between them.
     util::Result::Type applyVirginTerritories(core::CutList& cuts) override;
+    /// Says which events the preview stretch shows, so that edited memos follow; it writes nothing.
     util::Result::Type setProjectEvents(const core::EventList& events) override;
     /// The number of tracks is the project's own, not the one given.
     std::uint64_t estimateSteps(std::uint64_t eventCount, const core::Settings& settings,

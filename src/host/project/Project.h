@@ -208,7 +208,6 @@ private:
     /// Inserts a new track and makes it known by its role.
     void insertTrack(Velmark::IEditTransaction& transaction, Velmark::FUnknown* parent, Track& track,
                      std::int32_t role);
-    bool isMarkerRoleOn(std::int32_t role) const;
 
     // Edits.
     /// Selected, where the settings ask for selected tracks alone.
