@@ -25,7 +25,7 @@ public:
     public:
         virtual ~Listener() = default;
 
-        /// The tracks, or what they carry, aren't what they were.
+        /// The tracks, or what they carry, have changed.
         virtual void tracksChanged() = 0;
     };
 
