@@ -8,7 +8,7 @@
 
 namespace cadrel::app {
 
-/// Puts the cells of rows below one another, two blanks between the columns. The cells are printable UTF-8. All rows are
+/// Aligns the cells of rows in columns, with two blanks between them. The cells are printable UTF-8. All rows are
 /// measured before the first is written, so that none has to be kept; a cell that wasn't measured may reach further.
 class Columns {
 public:

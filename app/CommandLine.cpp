@@ -122,7 +122,7 @@ std::int32_t numberOf(const std::string& word, const Words& words)
     return static_cast<std::int32_t>(std::distance(words.begin(), std::find(words.begin(), words.end(), word)));
 }
 
-/// An empty name is a slip, such as a variable of a script that isn't set.
+/// An empty name is a mistake, such as a variable of a script that isn't set.
 std::string isNamed(const std::string& name)
 {
     return name.empty() ? "the name is empty" : std::string();
@@ -171,7 +171,7 @@ CLI::Option* addChoice(CLI::App& command, const char* name, const Words& words, 
         ->check(CLI::IsMember(wordList(words)));
 }
 
-/// The options that say how a change EDL is made; those that have no meaning where there is one.
+/// The options that say how a change EDL is made. Returns those that mean nothing when there already is one.
 std::vector<CLI::Option*> addMatching(CLI::App& command, GenerationOptions& generation)
 {
     addChoice(

@@ -14,7 +14,7 @@ struct Failure {
     std::string remedy;
 };
 
-/// A command line that can't be meant. Thrown by value; ends the program with status 2.
+/// A mistake in the command line. Thrown by value; ends the program with status 2.
 struct UsageError {
     std::string problem;
     std::string remedy = "see --help";

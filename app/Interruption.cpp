@@ -15,12 +15,12 @@ extern "C" void rememberRequest(int signal)
 
 void waitFor(int signal, struct sigaction& former)
 {
-    // A system call that waits, such as for the reader of a pipe, breaks off.
+    // The signal ends a system call that waits, such as for the reader of a pipe.
     struct sigaction action {};
     action.sa_handler = rememberRequest;
     sigemptyset(&action.sa_mask);
     sigaction(signal, &action, &former);
-    // What was started with the signal ignored, as nohup does, keeps ignoring it.
+    // If the program was started with the signal ignored, as nohup does, it keeps ignoring it.
     if (former.sa_handler == SIG_IGN)
         sigaction(signal, &former, nullptr);
 }

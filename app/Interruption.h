@@ -6,8 +6,8 @@
 
 namespace cadrel::app {
 
-/// While it lives, Ctrl-C and a request to end wait until the files being written are whole or gone: what is written
-/// piece by piece asks `check` between the pieces, and the end of this object lets the program end by the signal.
+/// While it lives, Ctrl-C or a request to end doesn't stop the program until the files being written are whole or gone.
+/// Code that writes in pieces calls `check` between them. When this object is destroyed, the signal ends the program.
 class Interruption {
 public:
     /// Thrown by `check`.

@@ -10,12 +10,12 @@
 
 namespace cadrel::app {
 
-/// Where `--json` goes: standard output for "-", else a file, which appears only when all of it is written and goes
-/// again unless it is kept. Every failure is thrown as Failure.
+/// Where `--json` goes: standard output for "-", else a file, which appears only when all of it is written and is
+/// removed again unless it is kept. Every failure is thrown as Failure.
 class JsonOutput {
 public:
     static bool isStandardOutput(const std::string& path) { return path == "-"; }
-    /// Whether it is asked for, and in a file.
+    /// Whether the user wants it, and in a file.
     static bool isFile(const std::string& path) { return !path.empty() && !isStandardOutput(path); }
 
     explicit JsonOutput(const std::string& path);
@@ -33,7 +33,7 @@ private:
     std::optional<util::FileReplacement> m_file; ///< nothing for standard output
 };
 
-/// Throws Failure when something that was given to standard output has not been taken.
+/// Throws Failure when not everything could be written to standard output.
 void flushStandardOutput();
 
 } // namespace cadrel::app

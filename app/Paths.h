@@ -12,7 +12,7 @@ namespace cadrel::app {
 /// A file name of the command line as the core takes it. Throws Failure for a name that is no UTF-8.
 std::wstring toWide(const std::string& path);
 
-/// Behind the last slash.
+/// What comes after the last slash.
 std::string fileNameOf(const std::string& path);
 
 /// Whether both paths name one regular file, or would when it is written.

@@ -6,7 +6,7 @@
 
 namespace cadrel::app {
 
-/// The program speaks the language in which its texts are written.
+/// Doesn't translate: the program uses its own texts.
 class PlainStringConverter : public util::StringConverter {
 public:
     std::wstring translate(const std::wstring& text) const override { return text; }

@@ -13,8 +13,8 @@ struct PrintableText {
     std::size_t width = 0; ///< in characters
 };
 
-/// The text as a terminal may get it: what is no UTF-8, controls the terminal or turns the writing direction becomes
-/// "?". A text of more than `mostCharacters` is cut and ends in "…".
+/// The text as it may go to a terminal: "?" replaces what isn't UTF-8, controls the terminal or changes the writing
+/// direction. A text of more than `mostCharacters` is cut and ends in "…".
 PrintableText toPrintable(std::string_view text, std::size_t mostCharacters = std::string_view::npos);
 
 /// Whether the bytes are UTF-8.

@@ -9,7 +9,7 @@
 
 namespace cadrel::app {
 
-/// Standard error: messages, a line each, and on a terminal a progress line that gives way to whatever comes next.
+/// Standard error: messages, a line each. On a terminal there is also a progress line, which the next message replaces.
 class Terminal {
 public:
     Terminal();
@@ -17,7 +17,7 @@ public:
     Terminal& operator=(const Terminal&) = delete;
     ~Terminal();
 
-    /// Whether there is one to show it on.
+    /// Whether standard error is a terminal.
     bool showsProgress() const { return m_showsProgress; }
     /// Shows what is being done, on a terminal only.
     void showProgress(const std::string& what);

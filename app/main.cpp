@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// `cadrel`: carries a sound project over to a new picture cut. This file knows the exit status; the command line and the
-// commands stand beside it.
+// `cadrel`: carries a sound project over to a new picture cut. This file decides the exit status; the command line and
+// the commands are in the other files.
 
 #include "app/CommandLine.h"
 #include "app/Failure.h"
@@ -48,7 +48,7 @@ void run(int argc, char** argv, Terminal& terminal)
     }
 }
 
-/// Nothing that is thrown ends the program without a word.
+/// Every exception ends the program with a message.
 int runToStatus(int argc, char** argv, Terminal& terminal)
 {
     try {

@@ -86,7 +86,7 @@ double secondsOf(const std::string& text)
     return isNegative ? -timecode->toSeconds() : timecode->toSeconds();
 }
 
-/// Puts what the user wants otherwise into the settings of the project.
+/// Puts the changes that the user wants into the settings of the project.
 void configure(Settings& settings, const ApplyOptions& options)
 {
     for (const auto& change : options.settings)
@@ -110,7 +110,7 @@ struct ChangeSource {
 /// Puts the change EDL into the model, and both cuts when it is made of them. Throws Failure.
 ChangeSource fillChangeList(DataModel& model, const ApplyOptions& options, Terminal& terminal)
 {
-    // What an earlier run left tells of other cuts.
+    // The lists of an earlier run belong to other cuts.
     for (core::EventList* const list : {&model.oldEdl(), &model.newEdl(), &model.changeEdl()})
         list->clear();
     GenerationOptions generation = options.generation;

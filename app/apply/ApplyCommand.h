@@ -24,14 +24,14 @@ struct ApplyOptions {
     std::string jsonFile;                 ///< empty: none is written; "-": standard output
     bool inPlace = false;                 ///< the result replaces the project
     bool summary = false;                 ///< the totals alone
-    /// What the user wants otherwise than the project has it, in the order in which it was given.
+    /// The changes that the user wants to the project's settings, in the order of the options.
     std::vector<std::function<void(core::Settings&)>> settings;
     /// The timecodes between which the project changes; none: what the settings say.
     std::vector<std::string> preserve;
 };
 
-/// `cadrel apply`: carries a sound project over to a new cut. The files appear together when all has gone well, or not at
-/// all, and what the user interrupts leaves them as they were. Throws Failure and UsageError.
+/// `cadrel apply`: carries a sound project over to a new cut. The files appear together when all has gone well, or not
+/// at all. If the user interrupts the run, they stay as they were. Throws Failure and UsageError.
 void runApply(const ApplyOptions& options, Terminal& terminal);
 
 } // namespace cadrel::app

@@ -16,7 +16,7 @@ using standin::Track;
 
 namespace {
 
-/// Whether runs mark on the track, which is so for all marker tracks of the system but that of the user's memos.
+/// Whether runs write markers on the track: true for all of Cadrel's marker tracks except the one for the user's memos.
 bool isMarkedByRuns(const Track& track)
 {
     const auto attribute = track.attributes().find(Velmark::AttributeKey::MarkerType);

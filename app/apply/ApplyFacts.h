@@ -23,12 +23,12 @@ struct PassedOver {
     std::string reason;
 };
 
-/// What there is to tell about a run.
+/// What the report tells about a run.
 struct ApplyFacts {
     /// The model outlives the facts.
     explicit ApplyFacts(const core::DataModel& ofProject) : model(ofProject) {}
 
-    /// The tracks of the user on which something lies or lay, and those on which runs mark.
+    /// The user's tracks that have or had something on them, and the tracks for the markers of a run.
     std::vector<const TrackComparison*> userTracks() const;
     std::vector<const TrackComparison*> markedTracks() const;
     std::size_t appliedCount() const;

@@ -49,7 +49,7 @@ std::string secondsText(double seconds)
     return text.data();
 }
 
-/// What the settings say that isn't usual.
+/// The settings that aren't the default.
 std::vector<std::string> unusualSettings(const Settings& settings, const ProjectClock& clock, double origin)
 {
     std::vector<std::string> words;
@@ -139,7 +139,7 @@ std::vector<Columns::Row> rowsOf(const Fate& fate, const ProjectClock& clock)
                      ? std::string(piece.shift > 0.0 ? "+" : "").append(clock.exactLength(piece.shift))
                      : std::string();
         rows.push_back(row);
-        // What is behind the first is told of the same clip.
+        // The rows after the first are about the same clip.
         row[0].clear();
         row[1].clear();
         row[6].clear();

@@ -16,7 +16,7 @@ public:
     ApplyListing(const ApplyFacts& facts, const ProjectClock& clock) : m_facts(facts), m_clock(clock) {}
 
     void printTotals(std::ostream& out) const;
-    /// A line for each track on which something lay, and then, track by track, one for all that isn't as it was.
+    /// A line for each track that had something on it, and then, track by track, a line for everything that changed.
     void printMoves(std::ostream& out) const;
     /// What the run marked, kind by kind.
     void printMarkers(std::ostream& out) const;

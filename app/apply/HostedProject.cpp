@@ -6,13 +6,15 @@
 #include "app/Interruption.h"
 #include "app/Terminal.h"
 #include "app/project/ProjectAccess.h"
+#include "core/notify/ChangeContext.h"
+#include "core/notify/ChangeContextListenerInterface.h"
 #include "host/Host.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 #include "util/Result.h"
 
 #include <iostream>
-#include <string_view>
+#include <optional>
 
 namespace cadrel::app {
 
@@ -34,11 +36,36 @@ Failure startFailure(Result::Type result, const std::string& file)
     }
 }
 
-/// The name under which the user can undo what was done last; empty for nothing.
-std::u16string_view lastEntryOf(const standin::UndoList& undoList)
+/// Why a run has ended before its end; nothing tells that it never began.
+Failure breakFailure(std::optional<Result::Type> result, const std::string& file)
 {
-    return undoList.canUndo() ? undoList.nameAt(undoList.doneCount() - 1) : std::u16string_view();
+    if (!result)
+        return {file, "the run didn't begin", "report it with the files"};
+    return {file, "the run broke off before its end: failure " + std::to_string(*result), "report it with the files"};
 }
+
+/// Hears how the run of a host ends.
+class RunEnd : public core::ChangeContextListenerInterface {
+public:
+    explicit RunEnd(host::Host& host) : m_host(host) { m_host.addListener(this); }
+    RunEnd(const RunEnd&) = delete;
+    RunEnd& operator=(const RunEnd&) = delete;
+    ~RunEnd() override { m_host.removeListener(this); }
+
+    /// Nothing until it has ended.
+    std::optional<Result::Type> result() const { return m_result; }
+
+    void onChange(const core::ChangeContext& context) override
+    {
+        const auto* const ended = dynamic_cast<const core::ActionChangeContext*>(&context);
+        if (ended && ended->action == core::ActionChangeContext::Run)
+            m_result = ended->result;
+    }
+
+private:
+    host::Host& m_host;
+    std::optional<Result::Type> m_result;
+};
 
 } // namespace
 
@@ -70,10 +97,11 @@ void HostedProject::apply()
     const Result::Type result = m_host->startCadrel();
     if (result != Result::Ok)
         throw startFailure(result, m_file);
+    const RunEnd end(*m_host);
     m_application.idle();
     Interruption::check();
-    if (lastEntryOf(m_project->undoList()) != u"Apply Cadrel")
-        throw Failure{m_file, "the run broke off before its end", "report it with the files"};
+    if (end.result() != Result::Ok)
+        throw breakFailure(end.result(), m_file);
 }
 
 void HostedProject::save(const std::string& file)

@@ -19,8 +19,8 @@ namespace cadrel::app {
 
 class Terminal;
 
-/// A project that is open in the stand-in host, with the system at work there as in any host: it gets the host's context,
-/// is told of the project, and its run is requested as the window does it and done on the host's next idle call.
+/// A project that is open in the stand-in host. Cadrel works there as in any host: it gets the host's context and is
+/// told of the project. A run is requested as the window requests it, and done in the host's next idle call.
 class HostedProject {
 public:
     /// Throws Failure when the file can't be read. The terminal shows the progress of a run.
@@ -33,7 +33,7 @@ public:
     core::DataModel& model();
 
     /// Applies the change list of the model. An Interruption cancels it, and what has been done is taken back. Throws
-    /// Interruption::Requested then, and Failure when the run couldn't begin or broke off.
+    /// Interruption::Requested then, and Failure when the run couldn't begin or failed.
     void apply();
 
     /// The host's own save, in which the model is stored with the project. Throws Failure.

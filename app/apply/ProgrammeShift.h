@@ -7,8 +7,8 @@
 
 namespace cadrel::app {
 
-/// By how much each stretch of the new programme stands later than it did in the old one, in seconds. Of stretches that
-/// overlap, the one that was added last holds, as it does in a run:
+/// How much later each stretch is in the new programme than in the old one, in seconds. Where stretches overlap, the
+/// one that was added last counts, as in a run:
 ///
 ///     first   |----- +2 -----|
 ///     then           |---- -1 ----|

@@ -47,7 +47,7 @@ std::vector<Placement> contentOf(const Track& track)
     return content;
 }
 
-/// Times gain and lose the time origin on their way.
+/// The time origin is added to times and subtracted again, which rounds them.
 bool isShorterThan(double a, double b)
 {
     return b - a > SameInstant;
@@ -59,7 +59,7 @@ double orNothing(double seconds)
     return isShorterThan(0.0, seconds) ? seconds : 0.0;
 }
 
-/// Finds what a piece has come from among what lay on one track.
+/// Finds the former clip or marker of a track from which a piece has come.
 class Origins {
 public:
     struct Origin {
@@ -67,7 +67,7 @@ public:
         Piece piece;
     };
 
-    /// The fates stay where they are for as long as they are looked for.
+    /// The fates must not move in memory while this is used.
     explicit Origins(std::vector<Fate>& fates)
     {
         for (Fate& fate : fates)
@@ -98,7 +98,7 @@ private:
         return !isShorterThan(piece.from, 0.0) && !isShorterThan(before.length(), piece.from + piece.now.length());
     }
 
-    /// A piece of a marker doesn't tell how far into it it begins, so that only the shift does.
+    /// A piece of a marker doesn't say how far into the marker it begins, so only the shift is used.
     static std::optional<Origin> markerAt(const Sources& sources, const Placement& now, double shift)
     {
         const double start = now.start - shift;
@@ -131,7 +131,7 @@ private:
     std::map<Key, Sources> m_groups;
 };
 
-/// A run carries nothing to one place twice: the second of two like markers there is new.
+/// A run carries nothing to the same place twice, so the second of two equal markers there is new.
 bool isThere(const Piece& piece, const std::vector<Piece>& pieces)
 {
     return std::any_of(pieces.begin(), pieces.end(), [&piece](const Piece& other) {
@@ -172,7 +172,7 @@ TrackComparison compareTrack(const Track& track, const std::vector<Placement>& b
         comparison.fates.push_back({placement, {}});
     std::vector<Placement> after = contentOf(track);
     if (after == before) {
-        // What stands where it stood hasn't come from its like at the place that was carried over to here.
+        // A clip that is where it was hasn't come from an equal clip at the place that was carried over to here.
         for (std::size_t index = 0; index < after.size(); ++index)
             comparison.fates[index].pieces.push_back({after[index]});
         return comparison;

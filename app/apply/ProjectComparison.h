@@ -13,7 +13,7 @@ namespace cadrel::app {
 
 class ProgrammeShift;
 
-/// A clip or a marker as it stands at some time. Clips in parts stand for the part.
+/// A clip or a marker with its place at one moment. For a part, each of its clips is listed.
 struct Placement {
     enum class Kind { Clip, Point, Range };
 
@@ -35,11 +35,11 @@ using ProjectState = std::map<const standin::Track*, std::vector<Placement>>;
 
 ProjectState stateOf(const standin::Project& project);
 
-/// A piece of a former clip or marker, or all of it, where it stands now.
+/// A piece of a former clip or marker, or all of it, at its new place.
 struct Piece {
     Placement now;
     double from = 0.0;  ///< how far into the former one it begins, in seconds
-    double shift = 0.0; ///< how much later it stands than it did
+    double shift = 0.0; ///< how much later it is than it was
 };
 
 /// What became of one clip or marker.
@@ -61,11 +61,11 @@ struct Fate {
 struct TrackComparison {
     const standin::Track* track;
     std::vector<Fate> fates;      ///< of all that lay on it
-    std::vector<Placement> added; ///< what has come from nothing that lay on it
+    std::vector<Placement> added; ///< what is new on the track
 };
 
-/// Compares the tracks of a project, from top to bottom and without folders, with what lay on them. What plays the same
-/// stretch of the same clip may have come from several places: `shift` tells from which it should have.
+/// Compares the tracks of a project, from top to bottom and without folders, with what was on them. A clip may have
+/// come from any place that played the same stretch of the same media; `shift` says which one it should be.
 std::vector<TrackComparison> compare(const ProjectState& before, const standin::Project& after,
                                      const ProgrammeShift& shift);
 

@@ -60,7 +60,7 @@ std::vector<Stretch> stretchesOf(const EventList& events, const Framerate& frame
     return stretches;
 }
 
-/// Disjoint stretches that don't touch, in order; each bears the first of its events.
+/// Disjoint stretches that don't touch, in order; each has the first of its events.
 std::vector<Stretch> uniteSorted(const std::vector<Stretch>& sorted)
 {
     std::vector<Stretch> united;
@@ -74,7 +74,7 @@ std::vector<Stretch> uniteSorted(const std::vector<Stretch>& sorted)
     return united;
 }
 
-/// What of `whole` lies outside `taken`; both disjoint and in order.
+/// The parts of `whole` outside `taken`; both are disjoint and in order.
 std::vector<Stretch> subtract(const std::vector<Stretch>& whole, const std::vector<Stretch>& taken)
 {
     std::vector<Stretch> left;

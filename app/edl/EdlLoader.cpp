@@ -79,7 +79,7 @@ Framerate EdlLoader::chooseRate(const std::string& firstFile) const
         throw unreadable(firstFile);
     if (const auto framerate = ProjectFramerate::fromShownRate(shown))
         return *framerate;
-    // A file that holds nothing to read needs another advice; 60 frames a second take every timecode.
+    // A file without anything readable needs different advice. At 60 frames a second every timecode can be read.
     const ProjectFramerate anyRate(Framerate(60, 0));
     LoadedEdl edl{firstFile, core::EventList(), {}};
     load(edl);

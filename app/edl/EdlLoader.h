@@ -15,7 +15,7 @@ class Terminal;
 
 struct LoadOptions {
     std::string rateLabel;    ///< one of ProjectFramerate::Labels; empty: what the first file shows
-    bool renameBRolls = true; ///< "A001B" is "A001" where the file holds that too
+    bool renameBRolls = true; ///< "A001B" is "A001" if the file has that too
     bool acceptAudio = false; ///< events of audio channels are no flaw
     bool strict = false;      ///< a warning is a failure
     /// What the user can do about a file that doesn't fit the rate.
@@ -38,7 +38,7 @@ public:
     core::Framerate chooseRate(const std::string& firstFile) const;
 
     /// Reads the files in order under the rate of the installed ProjectFramerate; a file that is named twice is read
-    /// once. Throws Failure for what can't be read or holds no events.
+    /// once. Throws Failure for a file that can't be read or has no events.
     std::list<LoadedEdl> load(const std::vector<std::string>& files) const;
 
     /// Throws Failure when no event of the file can be read as picture.

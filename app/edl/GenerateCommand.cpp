@@ -83,7 +83,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
         throw UsageError{"-o: \"-\" is no file name; the list goes to standard output with --json -"};
     checkOutputs(options, filesOf(options.changeFile, 1));
 
-    // Taking long lists apart event by event takes a while; the end of the program does it at once.
+    // Deleting long lists event by event takes a while; the end of the program frees them at once.
     static DataModel& model = *new DataModel;
     configure(model.settings(), options.generation);
     const ProjectFramerate framerate(

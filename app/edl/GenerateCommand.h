@@ -16,7 +16,7 @@ struct GenerateOptions {
     std::string jsonFile;   ///< empty: none is written; "-": standard output
 };
 
-/// `cadrel generate`: two cuts in, the change EDL and a summary of it out. The files appear together when all has gone
+/// `cadrel generate`: makes the change EDL of two cuts, and a summary. The files appear together when all has gone
 /// well, or not at all. Throws Failure and UsageError.
 void runGenerate(const GenerateOptions& options, Terminal& terminal);
 

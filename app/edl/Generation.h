@@ -37,7 +37,7 @@ struct Cuts {
 /// The files of both cuts.
 std::vector<std::string> inputsOf(const GenerationOptions& options);
 
-/// Puts the options into the settings. Throws UsageError for a VFX pattern that can't be one.
+/// Puts the options into the settings. Throws UsageError for an invalid VFX pattern.
 void configure(core::Settings& settings, const GenerationOptions& options);
 
 /// Puts the events of the files into the list; returns the names of the files. Throws Failure.

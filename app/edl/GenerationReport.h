@@ -16,7 +16,7 @@ class DataModel;
 
 namespace cadrel::app {
 
-/// What there is to tell about a change EDL that was made of two cuts, for people and for programs.
+/// The report about a change EDL that was made of two cuts, for people and for programs.
 class GenerationReport {
 public:
     /// The model holds both cuts and the change EDL, and outlives the report.

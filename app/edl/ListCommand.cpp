@@ -109,7 +109,7 @@ void runList(const ListOptions& options, Terminal& terminal)
     const EdlLoader loader(options.load, terminal);
     const ProjectFramerate rate(loader.chooseRate(options.files.front()));
     const std::string label = ProjectFramerate::labelOf(rate.getFramerate());
-    // Taking a long list apart event by event takes a quarter of the whole time; the end of the program does it at once.
+    // Deleting a long list event by event takes a quarter of the whole time; the end of the program frees it at once.
     static const auto& edls = *new std::list<LoadedEdl>(loader.load(options.files));
 
     terminal.clearProgress();

@@ -12,7 +12,7 @@
 
 namespace cadrel::app {
 
-/// Stands in for a project: while it lives, all timecodes are read under its rate.
+/// Takes the place of a project: while it lives, all timecodes are read at its rate.
 class ProjectFramerate : public core::FramerateProvider {
 public:
     /// The labels of all rates that a project can have.

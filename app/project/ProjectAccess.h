@@ -17,11 +17,11 @@ namespace cadrel::app {
 /// Throws Failure when the name can't be that of a project that may be read.
 void requireReadableProject(const std::string& file);
 
-/// What the error of the reading or of the writing of a project file means for the user.
+/// What an error in reading or writing a project file means for the user.
 Failure readingFailure(const standin::ProjectFileError& error, const std::string& file);
 Failure writingFailure(const standin::ProjectFileError& error, const std::string& file);
 
-/// Throws Failure for a project whose rate no timecode counts at.
+/// Throws Failure for a project with a rate at which there is no timecode.
 ProjectClock clockOf(const standin::Project& project, const std::string& file);
 
 } // namespace cadrel::app

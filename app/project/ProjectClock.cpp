@@ -33,7 +33,7 @@ ProjectClock::ProjectClock(const Velmark::FrameRateInfo& rate, double origin)
 
 std::string ProjectClock::rateLabel() const
 {
-    // Of a rate between the usual ones the number itself.
+    // A rate between the usual ones is shown as a number.
     if (m_framerate.rate != m_framerate.framesPerSecond && !m_framerate.pulledDown) {
         std::array<char, 32> text{};
         std::snprintf(text.data(), text.size(), "%.6g fps", m_framerate.rate);

@@ -24,7 +24,7 @@ public:
     /// The timecode of a time of the project to the nearest frame, and for a length.
     std::string timecode(double seconds) const { return toText(m_origin + seconds); }
     std::string length(double seconds) const { return toText(seconds); }
-    /// With the hundredths of a frame behind what doesn't lie on one: "03:00:07:12.25".
+    /// With hundredths of a frame for a time that isn't on a frame: "03:00:07:12.25".
     std::string exactTimecode(double seconds) const { return toExactText(m_origin + seconds); }
     std::string exactLength(double seconds) const { return toExactText(seconds); }
 

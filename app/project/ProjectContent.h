@@ -47,7 +47,7 @@ const char* kindOf(const standin::Event& event);
 
 /// Longer names are cut, so that one of them doesn't push the rest off the screen.
 inline constexpr std::size_t MostCharactersOfAName = 40;
-/// Behind the name of a marker there is nothing, and it is often a sentence.
+/// The name of a marker is often a sentence, and nothing comes after it in the row.
 inline constexpr std::size_t MostCharactersOfAMarker = 120;
 
 /// The name of a node as a terminal may get it; "(no name)" for none.
@@ -66,7 +66,7 @@ void visitEvents(const standin::Container& container, double start, std::size_t 
     }
 }
 
-/// The same for all events of a track, those in a part behind it.
+/// The same for all events of a track; those in a part come after it.
 template <class Visit>
 void visitAllEvents(const standin::Container& container, double start, std::size_t depth, Visit& visit)
 {

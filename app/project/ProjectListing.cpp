@@ -28,9 +28,9 @@ using standin::Track;
 namespace {
 
 constexpr std::size_t MostCharactersOfAValue = 120;
-/// What lies deeper is shown at the same place.
+/// Deeper levels aren't indented any further.
 constexpr std::size_t DeepestIndentation = 8;
-/// Of a curve with more points the first and the last are shown.
+/// For a curve with more points, only the first and the last are shown.
 constexpr std::size_t MostPoints = 8;
 constexpr std::size_t FirstPoints = 4;
 constexpr std::size_t LastPoints = 2;

@@ -36,13 +36,13 @@ using standin::Track;
 
 namespace {
 
-/// More names don't help to find the right one.
+/// A longer list of names doesn't help to find the right one.
 constexpr std::size_t MostNamesInAMessage = 40;
 constexpr std::size_t MostCharactersOfAName = 40;
 
 Project& read(const std::string& file, Terminal& terminal)
 {
-    // A long project is taken apart node by node; the end of the program does it at once.
+    // Deleting a long project node by node takes time; the end of the program frees it at once.
     static standin::ChangeLog& log = *new standin::ChangeLog;
     static Project* project = nullptr;
 

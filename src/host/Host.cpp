@@ -8,11 +8,11 @@
 #include "core/time/Timecode.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
-#include "host/picture/VideoProvider.h"
 #include "host/project/FramerateScope.h"
 #include "host/project/Project.h"
 #include "host/services/AlertWindow.h"
 #include "host/services/FileBrowserDialog.h"
+#include "host/video/ProjectVideo.h"
 #include "util/StringUtil.h"
 
 #include <utility>
@@ -38,12 +38,12 @@ std::wstring loadingAlert(Result::Type failure)
 
 } // namespace
 
-Host::Host(FUnknown* context)
+Host::Host(FUnknown* context, std::shared_ptr<ProjectVideo> video)
     : m_context(required(query<IHostContext>(context))),
       m_projectManager(required(service<IProjectManager>(m_context))),
       m_serviceContext(required(query<IHostContext>(context))), m_transport(service<ITransportControl>(m_context)),
       m_translator(std::make_shared<StringTranslator>(m_context.get())),
-      m_videoProvider(std::make_shared<VideoProvider>(m_context.get()))
+      m_videoProvider(video ? std::move(video) : std::make_shared<ProjectVideo>(m_context.get()))
 {
     registerWithHost();
     for (int32 index = 0; index < m_projectManager->projectCount(); ++index) {
@@ -113,7 +113,7 @@ void Host::open(IProjectDocument* document)
     entry.registration.add([this, document] { document->removeStorageNotification(this); });
     requireOk(dependencies->addDependent(document, this));
     entry.registration.add([this, document, dependencies] { dependencies->removeDependent(document, this); });
-    entry.project = std::make_unique<Project>(m_context.get(), document, m_videoProvider.get());
+    entry.project = std::make_unique<Project>(m_context.get(), document);
     Project& project = *entry.project;
     m_projects.emplace(document, std::move(entry));
     // A project whose data can't be read stays, with an empty model.
@@ -134,8 +134,9 @@ void Host::setCurrentProject(Project* project)
 {
     // Nothing is left behind half: the window follows whatever fails.
     FirstFailure failure;
+    std::vector<std::int32_t> dropped;
     if (m_currentProject != project) {
-        clearRequests();
+        dropped = dropRequests();
         m_restorePreviewState = false;
     }
     if (m_currentProject)
@@ -148,13 +149,8 @@ void Host::setCurrentProject(Project* project)
     }
     failure.ofStep([&] { m_videoProvider->setProject(project); });
     failure.ofStep([&] { notify(core::DataModelChangeContext(getProjectModel())); });
+    tellDropped(dropped);
     failure.raise();
-}
-
-void Host::clearRequests()
-{
-    m_runRequested = false;
-    m_previewRequested = false;
 }
 
 int32 Host::projectClosing(IProjectDocument* project, int32 /*reserved*/)

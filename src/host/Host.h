@@ -23,6 +23,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace Velmark {
 class IActionManager;
@@ -31,7 +32,7 @@ class IActionManager;
 namespace cadrel::host {
 
 class Project;
-class VideoProvider;
+class ProjectVideo;
 
 /// The one object through which the engine and the window reach the host. It keeps a Project for each project that is open
 /// there, follows which one is active, and carries out what the engine asks for on that one.
@@ -42,7 +43,8 @@ class VideoProvider;
 ///     onIdle()          progress > transaction > model command > run > commit under "Apply Cadrel"
 ///
 /// While such a transaction is open, what the host tells of edits is ignored. A run that fails keeps what it has done, under
-/// "Apply Cadrel (incomplete)"; one that the user cancels is undone.
+/// "Apply Cadrel (incomplete)"; one that the user cancels is undone. How each request ended the listeners hear in an
+/// ActionChangeContext, also of one that is dropped because the project is left or the preview ends.
 ///
 /// Cycles, locators and positions are seconds from the time origin, as the host has them; all other times are seconds of
 /// the project's clock. What is asked without an active project does nothing and answers Result::Ok, an empty result or
@@ -60,14 +62,16 @@ public:
     /// and catches up with the projects that are open. Throws Result::HostObjectMissing when the host has no context, no
     /// project manager or no idle calls, and Result::NotAvailable when the process has alerts or file boxes already;
     /// nothing stays registered then.
-    explicit Host(Velmark::FUnknown* context);
+    ///
+    /// `video` is given by who shows its pictures; without one the videos are written and none is shown.
+    explicit Host(Velmark::FUnknown* context, std::shared_ptr<ProjectVideo> video = nullptr);
     Host(const Host&) = delete;
     Host& operator=(const Host&) = delete;
     ~Host() override;
 
     /// The active project's; null without one.
     core::DataModel* getProjectModel();
-    const std::shared_ptr<VideoProvider>& getVideoProvider() const { return m_videoProvider; }
+    const std::shared_ptr<ProjectVideo>& getVideoProvider() const { return m_videoProvider; }
 
     // What the host tells.
 
@@ -113,6 +117,7 @@ public:
     // The steps of a run. Those that edit throw Result::NotAvailable when no transaction is open.
 
     util::Result::Type canStart() override;
+    /// Clears the preview: frees the tracks that the system holds locked and empties the preview stretch.
     util::Result::Type removeVirginTerritoryMarkers() override;
     util::Result::Type processEvent(core::Cut& cut) override;
     std::shared_ptr<core::Cut> makeCutEvents(const std::shared_ptr<core::EventBase>& changeEvent) override;
@@ -120,7 +125,9 @@ public:
     util::Result::Type generateMarkers(const std::vector<core::MarkerEntry>& entries) override;
     core::CadrelRunState getRunState() override;
     core::CadrelPreviewState getPreviewState() override;
+    /// Applies the cuts and then, where the settings ask for it, leads the automation over the stretches between them.
     util::Result::Type applyVirginTerritories(core::CutList& cuts) override;
+    /// Says which events the preview stretch shows, so that edited memos follow; it writes nothing.
     util::Result::Type setProjectEvents(const core::EventList& events) override;
     /// The number of tracks is the project's own, not the one given.
     std::uint64_t estimateSteps(std::uint64_t eventCount, const core::Settings& settings,
@@ -159,11 +166,16 @@ private:
     /// Null for what isn't registered.
     Project* find(Velmark::IProjectDocument* document) const;
     void setCurrentProject(Project* project);
-    void clearRequests();
     void settleAfterUndo(Project& project);
     static void showAlert(const std::wstring& message);
 
     // Runs and previews, in HostRuns.cpp.
+    /// Carries out what was requested and tells how it ended.
+    void serve(std::int32_t action, bool& request, const std::function<util::Result::Type()>& job);
+    /// Lowers the requests, and answers the actions that never begin for it.
+    std::vector<std::int32_t> dropRequests();
+    void tellDropped(const std::vector<std::int32_t>& actions);
+    /// Result::Cancelled when the user has cancelled it and it was taken back.
     util::Result::Type runCadrel();
     util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                   std::uint32_t options);
@@ -194,10 +206,11 @@ private:
     Velmark::Counted<Velmark::IHostContext> m_serviceContext;
     Transport m_transport;
     std::shared_ptr<StringTranslator> m_translator;
-    std::shared_ptr<VideoProvider> m_videoProvider;
-    bool m_processing = false; ///< from the begin of a transaction to the end of its commit
+    std::shared_ptr<ProjectVideo> m_videoProvider; ///< never null
+    bool m_processing = false;                     ///< from the begin of a transaction to the end of its commit
     bool m_runRequested = false;
     bool m_previewRequested = false;
+    std::optional<std::int32_t> m_served; ///< the action of the request that is being carried out
     core::EventList m_previewEvents{core::ListKind::Change};
     std::uint64_t m_previewFirst = 0;
     std::uint64_t m_previewLast = 0;

@@ -8,11 +8,11 @@
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
-#include "host/picture/VideoProvider.h"
 #include "host/project/Project.h"
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
 #include "host/undo/PreviewEventsStep.h"
+#include "host/video/ProjectVideo.h"
 #include "util/StringUtil.h"
 #include "velmark/UserInterface.h"
 
@@ -22,13 +22,11 @@
 
 using namespace Velmark;
 using cadrel::util::Result;
+using Action = cadrel::core::ActionChangeContext;
 
 namespace cadrel::host {
 
 namespace {
-
-/// Of the ActionChangeContext.
-enum Action : std::int32_t { PreviewAction = 0, RunAction = 1 };
 
 bool isOnlySelected(const core::Settings& settings)
 {
@@ -64,17 +62,39 @@ int32 Host::onIdle()
     // A progress window that lets idle calls through doesn't begin a second run within the first.
     if (m_progress)
         return ResultOk;
-    if (m_runRequested) {
-        runCadrel();
-        m_runRequested = false;
-        resultOf([this] { notify(core::ActionChangeContext(RunAction)); });
-    }
+    if (m_runRequested)
+        serve(Action::Run, m_runRequested, [this] { return runCadrel(); });
     if (m_previewRequested) {
-        runPreview(m_previewEvents, m_previewFirst, m_previewLast, m_previewOptions);
-        m_previewRequested = false;
-        resultOf([this] { notify(core::ActionChangeContext(PreviewAction)); });
+        serve(Action::Preview, m_previewRequested,
+              [this] { return runPreview(m_previewEvents, m_previewFirst, m_previewLast, m_previewOptions); });
     }
     return ResultOk;
+}
+
+void Host::serve(std::int32_t action, bool& request, const std::function<Result::Type()>& job)
+{
+    m_served = action;
+    const Result::Type result = job();
+    m_served.reset();
+    request = false;
+    resultOf([&] { notify(Action(action, result)); });
+}
+
+std::vector<std::int32_t> Host::dropRequests()
+{
+    std::vector<std::int32_t> dropped;
+    // What is being carried out ends by itself, and tells so.
+    if (std::exchange(m_runRequested, false) && m_served != Action::Run)
+        dropped.push_back(Action::Run);
+    if (std::exchange(m_previewRequested, false) && m_served != Action::Preview)
+        dropped.push_back(Action::Preview);
+    return dropped;
+}
+
+void Host::tellDropped(const std::vector<std::int32_t>& actions)
+{
+    for (const std::int32_t action : actions)
+        resultOf([&] { notify(Action::dropped(action)); });
 }
 
 Result::Type Host::startCadrel()
@@ -161,8 +181,10 @@ Result::Type Host::runCadrel()
             joinPieces(start, end);
         });
         requireSuccess(result);
-        if (actions)
+        if (actions) {
             takeBack(*actions);
+            throw Result::Cancelled;
+        }
     });
 }
 
@@ -289,11 +311,14 @@ void Host::joinPieces(double start, double end)
 
 Result::Type Host::endPreview()
 {
-    clearRequests();
+    const std::vector<std::int32_t> dropped = dropRequests();
     std::optional<LoweredPreviewFlag> lowered;
     if (m_currentProject && m_restorePreviewState)
         lowered.emplace(m_currentProject->model());
-    return finishPreview(DeletePreviewRange);
+    const Result::Type result = finishPreview(DeletePreviewRange);
+    lowered.reset();
+    tellDropped(dropped);
+    return result;
 }
 
 void Host::setPreviewActive(bool active)
@@ -304,8 +329,9 @@ void Host::setPreviewActive(bool active)
     core::DataModel& model = project.model();
     const bool wasActive = model.isPreviewActive();
     FirstFailure failure;
+    std::vector<std::int32_t> dropped;
     if (!active) {
-        clearRequests();
+        dropped = dropRequests();
         m_restorePreviewState = false;
     }
     if (wasActive && !active) {
@@ -326,6 +352,7 @@ void Host::setPreviewActive(bool active)
         failure.ofStep([&] { ensurePreviewOffset(project); });
     }
     failure.ofStep([&] { project.extendProjectEnd(active); });
+    tellDropped(dropped);
     failure.raise();
 }
 

@@ -17,13 +17,13 @@ namespace fs = std::filesystem;
 
 namespace {
 
-/// As many as the system itself follows.
+/// The system itself follows as many.
 constexpr int MostLinks = 40;
-/// From so many bytes on they are handed to the system.
+/// Content is collected up to so many bytes before it is written.
 constexpr std::size_t WellFilled = 1 << 16;
 constexpr mode_t ReadableAndWritable = 0666; // less what the user's mask takes away
 
-/// The file behind a symbolic link, which need not exist.
+/// The file that a symbolic link points to, which need not exist.
 fs::path followLinks(fs::path path)
 {
     std::error_code error;
@@ -61,7 +61,8 @@ bool isWritable(const fs::path& file)
     return true;
 }
 
-/// Waits until a file or folder is on the disk as it is now. Some disks don't know how, and have nothing to wait for.
+/// Waits until a file or folder is on the disk as it is now. Some disks don't support this; then there is nothing to
+/// wait for.
 bool waitForDisk(int descriptor)
 {
     int result = 0;
@@ -71,7 +72,7 @@ bool waitForDisk(int descriptor)
     return result == 0 || errno == EINVAL || errno == ENOTSUP || errno == ENOSYS;
 }
 
-/// The same for the names in a folder. A folder that can't be read is left to itself.
+/// The same for the names in a folder. Does nothing for a folder that can't be read.
 void syncFolderOf(const fs::path& file)
 {
     const fs::path folder = file.has_parent_path() ? file.parent_path() : fs::path(".");
@@ -175,7 +176,8 @@ void FileReplacement::putInPlace()
         return;
     std::error_code error;
     if (fs::is_regular_file(m_target, error)) {
-        // By a second name the former file stays in its place until the new one takes it. Some disks know no such names.
+        // With a second name, the former file keeps its place until the new one takes it. Some disks don't support
+        // second names.
         const fs::path aside = unusedNameBeside(m_target);
         fs::create_hard_link(m_target, aside, error);
         if (error)

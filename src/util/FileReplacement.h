@@ -8,28 +8,29 @@
 
 namespace cadrel::util {
 
-/// A file that takes the place of another only when all of it is written, so that a failure leaves what stood there.
+/// A file that takes the place of another only when all of it is written, so that a failure leaves the former file as
+/// it was.
 ///
 ///     constructed     notes.txt          the former file, if there is one
 ///                     .cadrel-1f3a...    what is being written
 ///     commit()        notes.txt          what has been written, with the former file's permissions
 ///
-/// A target that is a symbolic link stays one: the file behind it is replaced. A target that exists and is no regular
-/// file, such as a device or a pipe, is written directly and never removed.
+/// A target that is a symbolic link stays one: the file that it points to is replaced. A target that exists and isn't a
+/// regular file, such as a device or a pipe, is written directly and never removed.
 ///
-/// The content reaches the disk before the name does, so that after a crash or a power failure, too, there is all of the
-/// former file or all of the new one. What a crash may leave beside them is never taken for anything by a later
-/// replacement.
+/// The content reaches the disk before the name does, so that there is either the whole former file or the whole new
+/// one, also after a crash or a power failure. A crash may leave a hidden file in the folder; later replacements ignore
+/// it.
 ///
-/// Several files that belong together are put in place one after the other and kept when all are there; up to `keep`,
-/// destruction takes back what has been done.
+/// To replace several files together, put them in place one after the other, and call `keep` when all are there.
+/// Without `keep`, the destructor restores the former files.
 class FileReplacement {
 public:
     /// Throws Result::FileAccessFailed when the target can't be written, as for a folder or a write-protected file.
     explicit FileReplacement(const std::filesystem::path& target);
     FileReplacement(const FileReplacement&) = delete;
     FileReplacement& operator=(const FileReplacement&) = delete;
-    /// Restores what stood there, unless all was kept.
+    /// Restores the former file, unless `keep` or `commit` was called.
     ~FileReplacement();
 
     /// Appends to the file. Throws Result::FileAccessFailed when it can't be written; a full disk may show only later.
@@ -41,24 +42,24 @@ public:
     /// Makes the replacement final and drops the former file.
     void keep();
 
-    /// Finishes the file and replaces the former one at one stroke, so that the target exists at every moment.
-    /// Throws Result::FileAccessFailed. Only when the disk fails in the very last step is the new file there even so.
+    /// Finishes the file and replaces the former one in one step, so that the target exists at every moment. Throws
+    /// Result::FileAccessFailed. The new file is in place nevertheless if the disk fails in the very last step.
     void commit();
 
 private:
     void openBeside();
     void send(std::string_view text);
-    /// Closes the file. Whether all that was written has arrived.
+    /// Closes the file. Returns whether everything was written.
     bool close();
     void moveToTarget();
 
     std::filesystem::path m_target;     ///< with symbolic links followed; empty when the target is written directly
     std::filesystem::path m_unfinished; ///< empty when there is none (any more)
-    std::filesystem::path m_former;     ///< the former file while it stands aside, else empty
+    std::filesystem::path m_former;     ///< the former file while it is moved aside, else empty
     bool m_isPlaced = false;            ///< in the place of the target, but not kept yet
     int m_descriptor = -1;              ///< of the file that is written; -1 when none is open
     bool m_hasFailed = false;           ///< something of the content is lost
-    std::string m_pending;              ///< content that is handed to the system with what follows
+    std::string m_pending;              ///< content that isn't written yet
 };
 
 } // namespace cadrel::util

@@ -35,7 +35,7 @@ std::basic_string_view<Unit> withoutByteOrderMark(std::basic_string_view<Unit> t
     return text;
 }
 
-/// Nothing for a text that holds what is no character.
+/// Nothing for a text with a unit that isn't a character.
 std::optional<std::u16string> toUtf16(std::wstring_view wide)
 {
     std::u16string utf16;

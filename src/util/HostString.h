@@ -9,8 +9,8 @@
 namespace cadrel::util {
 
 /// One text in two forms at once, for the host's calls, which take UTF-16. It is built from either form and makes the
-/// other, without a byte order mark at the front. Nothing throws for a text that can't be converted: the other form
-/// then becomes a fixed text, so that the failure is visible in the interface:
+/// other, without a byte order mark at the front. A text that can't be converted doesn't throw. The other form then is
+/// a fixed text, so that the failure is visible in the interface:
 ///
 ///     "<StrErr_1>", "<StrErr_3>"  nothing is left of the text in UTF-16, or in wide form
 ///     "<StrErr_2>", "<StrErr_4>"  the wide text, or the UTF-16, is ill-formed

@@ -6,8 +6,8 @@
 
 namespace cadrel::util {
 
-/// Those who want to be told of something, each once. They aren't owned: a listener removes itself before it dies. They may
-/// be added and removed while they are told; one that is removed before its turn isn't told any more.
+/// Listeners, each of which is called once. They aren't owned: a listener removes itself before it dies. Listeners may
+/// be added and removed during the calls; one that is removed before its turn isn't called.
 template <class Listener>
 class ListenerSet {
 public:

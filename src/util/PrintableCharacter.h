@@ -4,7 +4,8 @@
 
 namespace cadrel::util {
 
-/// Whether a character is seen and does nothing else: it doesn't control a terminal or turn the writing direction.
+/// Whether a character is visible and has no other effect: it doesn't control a terminal or change the writing
+/// direction.
 constexpr bool isPrintable(char32_t character)
 {
     const auto within = [character](char32_t first, char32_t last) { return character >= first && character <= last; };

@@ -6,7 +6,7 @@
 
 namespace cadrel::util {
 
-/// The conversions between UTF-8 and wide text; translation is left to whoever knows the user's language.
+/// The conversions between UTF-8 and wide text; a derived class translates, because it knows the user's language.
 class StringConverter : public StringUtil::StringConverterInterface {
 public:
     /// Throws Result::InvalidArgument for a unit that is no Unicode character.

@@ -69,7 +69,7 @@ std::string StringUtil::toPrintable(const std::wstring& text)
 bool StringUtil::removeFile(const std::wstring& path)
 {
     const std::string name = toUtf8(path);
-    // The system would take the name up to the zero for another file's.
+    // The operating system would take the name up to the zero, which is another file.
     if (name.find('\0') != std::string::npos)
         return false;
     std::error_code error;

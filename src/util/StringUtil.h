@@ -8,8 +8,8 @@
 
 namespace cadrel::util {
 
-/// The string helpers around the two worlds of the system: 8-bit UTF-8 text in the model and in files, wide text for
-/// file names and for what the user reads.
+/// Helpers for the two kinds of text: UTF-8 in the model and in files, and wide text for file names and for what the
+/// user reads.
 class StringUtil {
 public:
     /// Converts between the two and translates; one object for the whole process.
@@ -52,7 +52,7 @@ public:
     /// Up to and including the last separator.
     static std::wstring directoryOf(const std::wstring& path);
     static std::wstring fileNameOf(const std::wstring& path);
-    /// Behind the last "." of the file name; empty without one.
+    /// What comes after the last "." of the file name; empty without one.
     static std::wstring extensionOf(const std::wstring& path);
     /// The file name up to its last ".".
     static std::wstring baseNameOf(const std::wstring& path);

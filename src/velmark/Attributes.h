@@ -102,8 +102,8 @@ class IAttributeData : public FUnknown {
 public:
     static constexpr InterfaceId<IAttributeData> iid{"fa1e32f9ca6d46f5a982f956b1191b58"};
 
-    /// Replaces what stood under the key. With `copy` the host keeps a copy; without, the bytes stay the caller's and have
-    /// to outlive the list.
+    /// Replaces the value under the key. With `copy` the host keeps a copy. Without it, the bytes belong to the caller
+    /// and have to outlive the list.
     virtual int32 setBinary(const char* key, const void* bytes, int32 size, bool copy) = 0;
     /// Fills the first `size` bytes of the buffer; nonzero, and nothing written, when there is nothing under the key or it
     /// has fewer bytes.
@@ -120,7 +120,7 @@ struct AttributeKey {
     static constexpr const char* StorageData = "CaDrData";
     /// On the project: the CRC-32 of the block, an integer.
     static constexpr const char* StorageChecksum = "CaDs";
-    /// On a track: 1 while the system holds it locked, 0 after.
+    /// On a track: 1 while Cadrel holds it locked, 0 afterwards.
     static constexpr const char* LockState = "Cadrel:LockState";
     /// On a marker, a video and a folder track: the role of the track, an integer.
     static constexpr const char* MarkerType = "Cadrel:MarkerType";

@@ -9,8 +9,8 @@ namespace Velmark {
 class FObject;
 class IIdleHandler;
 
-/// Through it the module reaches everything that the host has. It is what IPluginBase::initialize is given, and it answers
-/// `queryInterface` for IHostInfo and the other services as well.
+/// Gives the module access to everything that the host has. IPluginBase::initialize gets it. `queryInterface` also
+/// finds IHostInfo and the other services.
 class IHostContext : public FUnknown {
 public:
     static constexpr InterfaceId<IHostContext> iid{"eec8968380db43369177273e138a763b"};
@@ -38,11 +38,11 @@ class IIdleManager : public FUnknown {
 public:
     static constexpr InterfaceId<IIdleManager> iid{"9e871847f1ab4776a06c6f945d7fdd4d"};
 
-    /// The handler isn't counted: who adds it removes it before it goes. Both may be called from within an idle call.
+    /// The handler isn't counted: remove it before you delete it. Both may be called from within an idle call.
     virtual int32 addIdleHandler(IIdleHandler* handler) = 0;
     virtual int32 removeIdleHandler(IIdleHandler* handler) = 0;
-    /// Blocking counts: there are no idle calls until each `true` has had its `false`. The action "Edit"/"Undo" works
-    /// meanwhile.
+    /// The host counts these calls: there are no idle calls until each `true` has been followed by a `false`. The
+    /// action "Edit"/"Undo" works meanwhile.
     virtual int32 setIdleBlocked(bool blocked) = 0;
 };
 
@@ -51,13 +51,13 @@ class IDependencyManager : public FUnknown {
 public:
     static constexpr InterfaceId<IDependencyManager> iid{"f5246d5686544d60b026afb57b697b37"};
 
-    /// From now on the dependent's `update` is called with the object. Neither is counted: who adds a dependent removes it
-    /// before either goes. Of an FObject the host uses the operations of IDependent alone, with which it begins.
+    /// From now on the dependent's `update` is called with the object. Neither is counted: remove the dependent before
+    /// either is deleted. The host uses only the operations of IDependent, with which an FObject begins.
     virtual int32 addDependent(FUnknown* object, FObject* dependent) = 0;
     virtual int32 removeDependent(FUnknown* object, FObject* dependent) = 0;
 };
 
-/// A service of the host; nothing when it hasn't that one.
+/// A service of the host; nothing if the host doesn't have it.
 template <Identified T>
 [[nodiscard]] Counted<T> service(IHostContext* context)
 {

@@ -10,7 +10,7 @@
 
 namespace Velmark {
 
-/// Holds one reference to a counted object, or none. Where the reference comes from is always said:
+/// Holds one reference to a counted object, or none. The name of the operation says where the reference comes from:
 ///
 ///     auto tracks = Counted<IObjectList>::adopt(track->getAutomation());  // the call gave the reference
 ///     auto parent = Counted<IProjectNode>::share(node->getParent());      // borrowed; adds one

@@ -23,8 +23,8 @@ public:
 
 /// Edits of whole stretches. Its object answers to IEditTransaction too, which has to be open.
 ///
-/// All times are seconds from the time origin. A range holds its start and not its end. Edges that lie within 1/384000 s
-/// of one another are one instant.
+/// All times are seconds from the time origin. A range includes its start but not its end. Edges that differ by no more
+/// than 1/384000 s are the same instant.
 class IEditService : public FUnknown {
 public:
     static constexpr InterfaceId<IEditService> iid{"287cb9de71e54e36bde1c43bc6ed78cc"};
@@ -38,13 +38,13 @@ public:
     ///     destination   .X|-- A|---- B --|Y.......    what stood here is cleared
     ///
     /// Attributes travel with the pieces; so do automation points, with a point at either edge of the destination where
-    /// the curve would change outside of it. A point marker at `end` stays behind. What would come to lie below time 0 is
+    /// the curve would change outside of it. A point marker at `end` isn't copied. What would be below time 0 is
     /// dropped.
     virtual int32 copyRange(IProjectDocument* project, IObjectList* tracks, int32 reserved, double start, double end,
                             double destination) = 0;
-    /// Joins pieces that copyRange has split off one event and that stand side by side again, with equal attributes and a
-    /// continuous source. Cuts that the user made stay. 0 when something was joined, ResultFalse when there was nothing
-    /// to join, and 2 or above for a failure. `reserved` is 0.0.
+    /// Joins pieces that copyRange has split off one event and that are next to each other again, with equal attributes
+    /// and a continuous source. Cuts that the user made stay. 0 when something was joined, ResultFalse when there was
+    /// nothing to join, and 2 or above for a failure. `reserved` is 0.0.
     virtual int32 closeRange(IProjectDocument* project, IObjectList* tracks, double start, double end,
                              double reserved) = 0;
 };
@@ -57,8 +57,8 @@ public:
 
     /// Opens it; nonzero when one is open already. `flag` is true.
     virtual int32 begin(bool flag) = 0;
-    /// Closes it. What was edited becomes the entry `name` (UTF-16) of the project's undo list; a commit of nothing makes
-    /// no entry. The listeners are told from within: first the edit hooks, whose own edits still join the entry, then the
+    /// Closes it. What was edited becomes the entry `name` (UTF-16) of the project's undo list; a commit without edits
+    /// makes no entry. It calls the edit hooks first, whose own edits still become part of the entry, and then the
     /// dependents of the project.
     virtual int32 commit(IProjectDocument* project, const char16_t* name) = 0;
     /// `parent` is a container or a node. The project holds a reference to the child while it is inserted.
@@ -72,7 +72,7 @@ public:
     /// `reserved` is 0.
     virtual int32 copyAll(IProjectDocument* project, FUnknown** clipboard, double start, double end,
                           int32 reserved) = 0;
-    /// Writes it at `destination` over what stands there, as copyRange does. `reserved` is 0.
+    /// Writes it at `destination` over what is there, as copyRange does. `reserved` is 0.
     virtual int32 paste(IProjectDocument* project, FUnknown* clipboard, int32 reserved, double destination) = 0;
     /// Empties the range on every track but rulers. What hangs over its edges is cut; automation points in it go, with a
     /// point at an edge where the curve would change outside. `reserved` is 0.

@@ -19,7 +19,7 @@ public:
     /// Our own, for queries within the module.
     static constexpr InterfaceId<FObject> iid{"0c39f86388e9607cc24b9efec3ce3d29"};
     static constexpr const char* ClassName = "FObject";
-    /// What the count holds from the last release on, so that a mistaken second one is seen.
+    /// The value of the count after the last release, so that a mistaken further release is noticed.
     static constexpr int32 ReleasedCount = -1000;
 
     FObject() = default;
@@ -55,7 +55,7 @@ public:
 
     int32 refCount() const { return m_refCount.load(std::memory_order_relaxed); }
 
-    /// The process-wide handler, or none. It isn't owned: who sets it takes it away again.
+    /// The process-wide handler, or none. It isn't owned: whoever sets it removes it again.
     static void setUpdateHandler(UpdateHandler* handler);
 
 private:

@@ -8,11 +8,11 @@ namespace Velmark {
 
 /// The messages of `IDependent::update`. A host may send others.
 struct UpdateMessage {
-    /// The object, or something in it, is no longer what it was.
+    /// The object, or something in it, has changed.
     static constexpr int32 Changed = 0;
 };
 
-/// Who wants to be told of the changes of another object.
+/// Is told of the changes of another object.
 class IDependent : public FUnknown {
 public:
     static constexpr InterfaceId<IDependent> iid{"f52b7aaede72416d8af18ace9dd7bd5e"};

@@ -16,7 +16,7 @@ struct Identifier {
     static constexpr std::size_t Size = 16;
 
     constexpr Identifier() = default;
-    /// From 32 hexadecimal digits, for constants: a slip in their text doesn't compile.
+    /// From 32 hexadecimal digits, for constants: a mistake in their text doesn't compile.
     explicit constexpr Identifier(const char (&digits)[2 * Size + 1])
     {
         for (std::size_t index = 0; index < Size; ++index) {
@@ -47,8 +47,8 @@ struct Identifier {
 
 static_assert(sizeof(Identifier) == Identifier::Size && alignof(Identifier) == 1);
 
-/// The identifier of one interface. It carries the interface in its type, so that what derives from an interface isn't
-/// taken for it.
+/// The identifier of one interface. Its type names the interface, so that a class that derives from an interface isn't
+/// mistaken for it.
 template <class Interface>
 struct InterfaceId : Identifier {
     explicit constexpr InterfaceId(const char (&digits)[2 * Size + 1]) : Identifier(digits) {}

@@ -14,7 +14,7 @@ class IHostWindow;
 class IPlugView;
 class IProjectDocument;
 
-/// Told of projects that come and go: IProjectManager::addNotification. The results don't count.
+/// Is told when projects are opened, activated and closed: IProjectManager::addNotification. The results don't count.
 class IProjectNotification : public FUnknown {
 public:
     static constexpr InterfaceId<IProjectNotification> iid{"98f69ac5578d4a22b8e02781c06cff25"};
@@ -39,7 +39,7 @@ public:
     virtual int32 projectStoring(IProjectDocument* project) = 0;
 };
 
-/// Told of edits while they can still be added to. Comes in with IProjectManager::addNotification.
+/// Is called at the end of a transaction and can add edits to it. Added with IProjectManager::addNotification.
 class IProjectEditHook : public FUnknown {
 public:
     static constexpr InterfaceId<IProjectEditHook> iid{"edc5af8faabd46e8b86839cfe14cab1f"};

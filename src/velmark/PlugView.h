@@ -25,7 +25,7 @@ static_assert(offsetof(ViewRect, right) == 8 && offsetof(ViewRect, bottom) == 12
 /// The host's side of a view. It has no identifier.
 class IPlugFrame : public FUnknown {
 public:
-    /// The view wishes that size; when the host grants it, it calls the view's onSize.
+    /// The view asks for that size. If the host agrees, it calls the view's onSize.
     virtual int32 resizeView(IPlugView* view, const ViewRect& rect) = 0;
 };
 
@@ -37,7 +37,7 @@ public:
 
     /// The view becomes visible in a native parent of the kind `type`.
     virtual int32 attached(void* parent, const char* type) = 0;
-    /// It isn't any more.
+    /// The view is no longer visible.
     virtual int32 removed() = 0;
     virtual int32 idle() = 0;
     virtual int32 onWheel(float distance) = 0;

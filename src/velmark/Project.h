@@ -27,8 +27,8 @@ public:
     virtual IProjectDocument* projectAt(int32 index) = 0;
     /// Borrowed; null when none is active.
     virtual IProjectDocument* activeProject() = 0;
-    /// The listener isn't counted: who adds it removes it before it goes. When it has an IProjectEditHook, that is taken
-    /// too. It isn't told of projects that are open already.
+    /// The listener isn't counted: remove it before you delete it. If it has an IProjectEditHook, that is added too. It
+    /// isn't told of projects that are open already.
     virtual int32 addNotification(IProjectNotification* listener) = 0;
     virtual int32 removeNotification(IProjectNotification* listener) = 0;
 };
@@ -48,13 +48,13 @@ public:
     virtual IMarkerTrack* getDefaultMarkerTrack() = 0;
     /// Borrowed.
     virtual ILocators* getLocators() = 0;
-    /// The time context of an object, to be passed on as `container`, `parent` or `newParent`: of one that can have
-    /// children (a track, a folder, a part, a curve) the object itself, of any other what it lies in, of null the root.
-    /// Counted; null for what belongs to no place in this project.
+    /// The time context of an object, to be passed on as `container`, `parent` or `newParent`. For an object that can
+    /// have children (a track, a folder, a part, a curve) it is the object itself, for any other its parent, and for
+    /// null the root. Counted; null for an object that isn't in this project.
     virtual FUnknown* getContainer(FUnknown* object) = 0;
     /// A new track of the kind, with the interfaces of its kind; counted, and not inserted yet. Null for an unknown word.
     virtual FUnknown* createTrack(const char* typeWord) = 0;
-    /// The listener isn't counted: who adds it removes it before it goes.
+    /// The listener isn't counted: remove it before you delete it.
     virtual int32 addStorageNotification(IProjectStorageNotification* listener) = 0;
     virtual int32 removeStorageNotification(IProjectStorageNotification* listener) = 0;
     /// Borrowed.

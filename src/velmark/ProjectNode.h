@@ -26,7 +26,7 @@ struct TypeWord {
 
 /// The bits of IProjectNode::changeFlags.
 struct ChangeFlag {
-    /// The object was removed or moved away. It is kept alive until all have been told.
+    /// The object was removed or moved away. It is kept alive until all listeners have been called.
     static constexpr uint32 Removed = 2;
     /// Children were added or removed. The project has it for tracks at any depth.
     static constexpr uint32 Children = 4;
@@ -40,14 +40,14 @@ struct ChangeFlag {
 /// is time 0. `container` is the time context that IProjectDocument::getContainer gives. Null, the root, a folder, a track
 /// and a curve all mean these times; a part means seconds from its own start.
 ///
-/// What is not inserted has its times from the start of the project, and keeps them when it is. Setters work there, and
-/// outside transactions too; inside one they belong to it.
+/// A node that isn't inserted yet has times from the start of the project, and keeps them when it is inserted. Setters
+/// work there too. They also work outside of transactions; inside one they belong to it.
 class IProjectNode : public FUnknown {
 public:
     static constexpr InterfaceId<IProjectNode> iid{"7a6f999fbdbc4bccac403dabace8a171"};
 
     virtual bool isType(const char* word) = 0;
-    /// What is being told of the object just now, as ChangeFlag bits; 0 at any other time.
+    /// The change that listeners are being told of now, as ChangeFlag bits; 0 at any other time.
     virtual uint32 changeFlags() = 0;
     /// Replaces the attribute. A persistent one is stored with the project, any other is gone once it closes.
     virtual int32 setAttribute(const char* key, const FVariant& value, bool persistent) = 0;
@@ -76,15 +76,15 @@ public:
     /// The children by their start, those of a folder or the root in their order from top to bottom; a part is one child.
     /// Counted.
     virtual INodeIterator* newChildIterator() = 0;
-    /// Borrowed. The root has none, and neither has what isn't inserted; a track that is in no folder has the root.
+    /// Borrowed. The root and a node that isn't inserted have none; a track that is in no folder has the root.
     virtual IProjectNode* getParent() = 0;
 };
 
-/// A walk over the children of a node. An edit of the node ends its use. It has no identifier.
+/// Iterates over the children of a node. Don't use it after the node has been edited. It has no identifier.
 class INodeIterator : public FUnknown {
 public:
     virtual bool isDone() = 0;
-    /// The child, and one step on; borrowed. Null when done.
+    /// Returns the child and moves on; borrowed. Null when done.
     virtual IProjectNode* next() = 0;
 };
 

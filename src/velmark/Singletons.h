@@ -7,8 +7,8 @@
 
 namespace Velmark {
 
-/// The objects that exist once and live until the module goes. They are released in the reverse of the order in which
-/// they came, so that each can count on those before it to the end.
+/// The objects that exist once and live until the module is unloaded. They are released in reverse order, so that each
+/// can use those that were added before it to the end.
 class Singletons {
 public:
     Singletons() = default;
@@ -19,10 +19,10 @@ public:
     /// Those of this process.
     static Singletons& ofProcess();
 
-    /// Takes over the reference of the object's maker. Once the shutdown has begun nothing is added: the answer is
-    /// false, and the reference stays with the caller.
+    /// Takes over the reference of the object's maker. After the shutdown has begun, nothing is added: it returns
+    /// false, and the caller keeps the reference.
     bool add(FObject* singleton);
-    /// Releases them all; at the latest the end of the process does so. A second call does nothing.
+    /// Releases them all; this also happens at the end of the process. A second call does nothing.
     void shutDown();
     bool hasShutDownBegun() const { return m_shuttingDown; }
 

@@ -59,7 +59,7 @@ public:
         m_elements.erase(found);
         return true;
     }
-    /// Removes the last element and gives it; a T of its own making, null for a pointer, when there is none.
+    /// Removes the last element and returns it; if there is none, a default T, which is null for a pointer.
     T removeLast()
     {
         const T last = at(count() - 1);
@@ -67,7 +67,7 @@ public:
             m_elements.pop_back();
         return last;
     }
-    /// A T of its own making, null for a pointer, at an index that isn't there.
+    /// A default T, which is null for a pointer, at an index that isn't there.
     T at(int32 index) const
     {
         return index >= 0 && index < count() ? m_elements[static_cast<std::size_t>(index)] : T();
@@ -80,14 +80,14 @@ private:
     std::vector<T> m_elements;
 };
 
-/// Walks over an array, which has to outlive it. What is added meanwhile is walked over too.
+/// Iterates over an array, which has to outlive it. Elements that are added meanwhile are included.
 template <class T>
 class TIterator {
 public:
     explicit TIterator(const TArray<T>& array) : m_array(array) {}
 
     bool isDone() const { return m_next >= m_array.count(); }
-    /// The element, and one step on; a T of its own making when done.
+    /// Returns the element and moves on; a default T when done.
     T next() { return isDone() ? T() : m_array.at(m_next++); }
 
 private:

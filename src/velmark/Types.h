@@ -13,7 +13,7 @@ using uint16 = std::uint16_t;
 using uint32 = std::uint32_t;
 using uint64 = std::uint64_t;
 
-/// What an operation of an interface answers, unless it says otherwise: 0 is success and every other value a refusal.
+/// What an operation of an interface returns, unless it says otherwise: 0 is success and every other value a failure.
 /// These are the values that have a meaning of their own.
 inline constexpr int32 ResultOk = 0;
 /// "No", or: there was nothing to do.

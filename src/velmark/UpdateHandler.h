@@ -9,8 +9,8 @@ namespace Velmark {
 class FObject;
 class IDependent;
 
-/// Who spreads the changes of FObjects to their dependents, for the whole process: FObject::setUpdateHandler. It ends
-/// each round of a changed object with `updateDone`.
+/// Tells dependents of the changes of FObjects, for the whole process: FObject::setUpdateHandler. It ends each round of
+/// a changed object with `updateDone`.
 class UpdateHandler {
 public:
     virtual ~UpdateHandler() = default;

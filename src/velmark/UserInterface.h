@@ -103,7 +103,7 @@ public:
     static constexpr const char* Undo = "Undo";
     static constexpr const char* Redo = "Redo";
 
-    /// The handler isn't counted: who adds it removes it before it goes.
+    /// The handler isn't counted: remove it before you delete it.
     virtual int32 addHandler(IActionHandler* handler) = 0;
     virtual int32 removeHandler(IActionHandler* handler) = 0;
     /// 0 when somebody carried the action out. `reserved` is 0.
@@ -130,12 +130,12 @@ class IWindowFactoryRegistry : public FUnknown {
 public:
     static constexpr InterfaceId<IWindowFactoryRegistry> iid{"23f569f36ebe44d69c0364ce6908c3e8"};
 
-    /// The factory isn't counted: who adds it removes it before it goes.
+    /// The factory isn't counted: remove it before you delete it.
     virtual int32 addFactory(IPlugWindowFactory* factory) = 0;
     virtual int32 removeFactory(IPlugWindowFactory* factory) = 0;
 };
 
-/// A window of the host. It has no identifier. While it is open, until windowClosed has been told, the host holds a
+/// A window of the host. It has no identifier. While it is open, until windowClosed has been called, the host holds a
 /// reference of its own.
 class IHostWindow : public FUnknown {
 public:

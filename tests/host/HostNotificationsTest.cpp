@@ -583,7 +583,13 @@ TEST_F(HostNotificationsTest, BringsPicturesWithTheIdleCalls)
 {
     const juce::ScopedJuceInitialiser_GUI fonts;
     PictureListener listener;
-    VideoProvider& pictures = *host.adapter().getVideoProvider();
+    host.adapter().removeListener(&heard);
+    host.disconnect();
+    const auto provider = std::make_shared<VideoProvider>(&host.altered);
+    host.connect(provider);
+    host.adapter().addListener(&heard);
+    ASSERT_EQ(host.adapter().getVideoProvider(), provider);
+    VideoProvider& pictures = *provider;
     pictures.addListener(&listener);
     pictures.setImageSize(64, 36);
     EXPECT_EQ(listener.pictures, 0);

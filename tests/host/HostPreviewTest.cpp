@@ -310,6 +310,44 @@ TEST_P(HostPreviewTest, WritesTheNewPictureInThePreview)
     EXPECT_DOUBLE_EQ(events[0]->getStart(nullptr), Day + host.inHost(5.0));
 }
 
+TEST_P(HostPreviewTest, LeavesTheNewPictureOfTheProgrammeAsItIs)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:05:00"), core::Timecode("00:00:04:00")),
+        false);
+    previewAll();
+    adapter().setPreviewActive(false);
+    const Node video = host.trackNamed(u"New Video");
+    host.addSound(video, u"approved", 2.0, 4.0);
+
+    previewAll();
+    EXPECT_EQ(host.contentOf(video)[0], "approved 2-4");
+    EXPECT_EQ(host.contentOf(video).size(), 2U);
+
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(video), Texts{"approved 2-4"});
+}
+
+TEST_P(HostPreviewTest, LeavesVideoTracksAloneThatHaveNoRole)
+{
+    const Node picture = host.addTrack(TypeWord::Video, u"Picture");
+    const Node second = host.addTrack(TypeWord::Video, u"Temp VFX");
+    host.addSound(second, u"shot", 0.0, 10.0);
+    query<ITrackNode>(second)->setFlag(TrackFlag::Lock, true);
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:05:00"), core::Timecode("00:00:04:00")),
+        false);
+
+    previewAll();
+    adapter().setPreviewActive(false);
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(second), Texts{"shot 0-10"});
+    EXPECT_TRUE(isLocked(second));
+    EXPECT_TRUE(host.contentOf(picture).empty());
+    EXPECT_EQ(host.contentOf(host.trackNamed(u"New Video")).size(), 1U);
+}
+
 TEST_P(HostPreviewTest, MovesToItsEvents)
 {
     adapter().setPreviewActive(true);

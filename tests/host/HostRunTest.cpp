@@ -37,13 +37,21 @@ using Entries = AdaptedHost::Entries;
 class ActionListener : public core::ChangeContextListenerInterface {
 public:
     std::vector<std::int32_t> actions;
+    std::vector<Result::Type> results;
+    std::vector<bool> dropped;
 
     void onChange(const ChangeContext& context) override
     {
-        if (const auto* action = dynamic_cast<const core::ActionChangeContext*>(&context))
-            actions.push_back(action->action);
+        const auto* action = dynamic_cast<const core::ActionChangeContext*>(&context);
+        if (!action)
+            return;
+        actions.push_back(action->action);
+        results.push_back(action->result);
+        dropped.push_back(action->isDropped);
     }
 };
+
+using Results = std::vector<Result::Type>;
 
 /// A transport that tells when it is stopped.
 class StoppedTransport : public Implements<StoppedTransport, FObject, ITransportControl> {
@@ -135,6 +143,8 @@ TEST_P(HostRunTest, CarriesTheMaterialOver)
 
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
     EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    EXPECT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_EQ(heard.dropped, std::vector<bool>{false});
     EXPECT_FALSE(host.isEditOpen());
 }
 
@@ -508,6 +518,8 @@ TEST_P(HostRunTest, LeavesEverythingAsItWasWhereverItIsCancelled)
         EXPECT_FALSE(host.isEditOpen());
         EXPECT_FALSE(host.application.idleManager().isBlocked());
         const bool isTakenBack = host.undoNames() == entriesBefore;
+        EXPECT_EQ(heard.results.back(), isTakenBack ? Result::Cancelled : Result::Ok);
+        EXPECT_FALSE(heard.dropped.back());
         EXPECT_EQ(host.bytes(), isTakenBack ? before : after) << "cancelled in call " << call;
         if (isTakenBack) {
             ++takenBack;
@@ -594,6 +606,7 @@ TEST_P(HostRunTest, SaysThatItIsIncompleteWhereItIsCancelledAndCannotBeTakenBack
     host.idle();
 
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
+    EXPECT_EQ(heard.results, Results{Result::HostObjectMissing});
     EXPECT_FALSE(host.isEditOpen());
     EXPECT_FALSE(host.application.idleManager().isBlocked());
     EXPECT_EQ(progress->calls.back(), "end");
@@ -615,6 +628,8 @@ TEST_P(HostRunTest, KeepsWhatItHasDoneWhenItFails)
     EXPECT_FALSE(host.application.idleManager().isBlocked());
     EXPECT_TRUE(host.trackNamed(u"Memos"));
     EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    EXPECT_EQ(heard.results, Results{Result::HostObjectMissing});
+    EXPECT_EQ(heard.dropped, std::vector<bool>{false});
     EXPECT_TRUE(host.alerts->messages.empty());
     ASSERT_TRUE(host.undo());
     EXPECT_EQ(host.bytes(), before);
@@ -643,6 +658,7 @@ TEST_P(HostRunTest, LeavesATransactionAloneThatAnotherHasOpen)
 
     EXPECT_TRUE(host.isEditOpen());
     EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    EXPECT_EQ(heard.results, Results{Result::HostCallFailed});
     ASSERT_EQ(host.transaction()->commit(host.document(), u"Other"), ResultOk);
     EXPECT_EQ(host.undoNames(), entriesBefore);
     EXPECT_EQ(host.bytes(), before);
@@ -681,7 +697,69 @@ TEST_P(HostRunTest, IsForgottenWhenTheProjectChanges)
 
     EXPECT_EQ(host.undoNames(), entriesBefore);
     EXPECT_EQ(other.undoList().size(), 0U);
+}
+
+TEST_P(HostRunTest, ARequestIsToldAsDroppedWhenTheProjectChanges)
+{
+    requestRun();
+    ASSERT_EQ(host.adapter().startPreview(host.model().changeEdl(), 0, 0, 0), Result::Ok);
     EXPECT_TRUE(heard.actions.empty());
+
+    host.application.activateProject(&host.project);
+    EXPECT_TRUE(heard.actions.empty()) << "It is the same project.";
+    host.application.activateProject(&host.application.createProject());
+
+    EXPECT_EQ(heard.actions, (std::vector<std::int32_t>{1, 0}));
+    EXPECT_EQ(heard.results, (Results{Result::Cancelled, Result::Cancelled}));
+    EXPECT_EQ(heard.dropped, (std::vector<bool>{true, true}));
+
+    host.application.activateProject(&host.project);
+    host.idle();
+    EXPECT_EQ(heard.actions.size(), 2U) << "Once is enough.";
+}
+
+TEST_P(HostRunTest, ARequestIsToldAsDroppedWhenThePreviewEnds)
+{
+    requestRun();
+    host.adapter().endPreview();
+    EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    EXPECT_EQ(heard.dropped, std::vector<bool>{true});
+
+    ASSERT_EQ(host.adapter().startPreview(host.model().changeEdl(), 0, 0, 0), Result::Ok);
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(heard.actions, (std::vector<std::int32_t>{1, 0}));
+    EXPECT_EQ(heard.dropped, (std::vector<bool>{true, true}));
+
+    host.adapter().endPreview();
+    host.adapter().setPreviewActive(false);
+    host.idle();
+    EXPECT_EQ(heard.actions.size(), 2U);
+}
+
+TEST_P(HostRunTest, WhatIsBeingCarriedOutIsToldOnceThoughThePreviewEndsMeanwhile)
+{
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back() == "show")
+            host.adapter().setPreviewActive(false);
+    };
+
+    host.conform();
+
+    EXPECT_EQ(heard.actions, std::vector<std::int32_t>{1});
+    EXPECT_EQ(heard.dropped, std::vector<bool>{false});
+}
+
+TEST_P(HostRunTest, APreviewTellsHowItEnded)
+{
+    ASSERT_EQ(host.adapter().startPreview(host.model().changeEdl(), 0, 0, 0), Result::Ok);
+    host.idle();
+    ASSERT_EQ(host.adapter().startPreview(host.model().changeEdl(), 0, 0, 0), Result::Ok);
+    host.altered.hide(ClassId::ObjectList);
+    host.idle();
+
+    EXPECT_EQ(heard.actions, (std::vector<std::int32_t>{0, 0}));
+    EXPECT_EQ(heard.results, (Results{Result::Ok, Result::HostObjectMissing}));
 }
 
 TEST_P(HostRunTest, RunsOnTheActiveOfTwoProjects)

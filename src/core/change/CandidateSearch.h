@@ -14,8 +14,8 @@ namespace cadrel::core {
 
 class EventBase;
 
-/// Finds, for one new event after the other, the stretches of old programme that show the same material, and decides
-/// between those that claim the same source.
+/// Finds, for one new event after the other, the stretches of the old programme that show the same material. If several
+/// overlap in the source, it decides which one survives.
 ///
 ///     source        |------------ new event ------------|
 ///     old events       |---- A ----|  |--- B ---|
@@ -27,12 +27,12 @@ public:
     /// Adds a valid event of the old list, in the order of the list, under the name that it is compared by. Throws what
     /// Timecode::toFrameCount throws for a timecode that isn't valid at the rate.
     void addOldEvent(const std::string& name, const EventBase& event);
-    /// To be called when all are added, before the first search.
+    /// Call it after all events have been added and before the first search.
     void finish() { m_index.finish(); }
 
     /// The candidates that survive for a valid new event, in the order of the old events. `lastDisplacement` is that of
-    /// the previous placement, in seconds: of candidates of one length, that which keeps nearest to it survives. Throws
-    /// Result::OutOfRange when a candidate, also one that wouldn't survive, leaves the day.
+    /// the previous placement, in seconds: among candidates of the same length, the one whose displacement is nearest
+    /// to it survives. Throws Result::OutOfRange when a candidate leaves the day, even if it wouldn't survive.
     std::vector<ChangeCandidate> survivingCandidates(const std::string& name, const EventBase& newEvent,
                                                      double lastDisplacement) const;
 

@@ -14,10 +14,10 @@ namespace cadrel::core {
 class EventBase;
 class EventList;
 
-/// Finds what of the old programme survives in the new one. Events of the two EDLs that use the same material, known by
-/// roll name or clip name without VFX versions, are intersected by their source ranges; each stretch that both use
-/// becomes an event of the change EDL: its SRC is where the stretch stood in the old programme, its DST where it stands
-/// in the new one.
+/// Finds what of the old programme survives in the new one. It compares the events of the two EDLs that use the same
+/// material, which have the same roll name or clip name without VFX versions. Where their source ranges overlap, both
+/// use the same stretch of material, and this stretch becomes an event of the change EDL. Its SRC is the place of the
+/// stretch in the old programme, its DST the place in the new one.
 ///
 ///     old programme   |---- A ----|------ B ------|
 ///     source of A     10         20
@@ -27,16 +27,16 @@ class EventList;
 ///
 ///     change EDL      SRC = old DST IN + 4 .. + 8      DST = new DST IN .. + 4
 ///
-/// Transitions are cut out first as events of their own, since material inside one can only be carried over when both
-/// sides have the same transition, and put together again behind.
+/// Transitions are first cut out as events of their own, because material inside one can only be carried over when both
+/// sides have the same transition. Afterwards they are joined with their events again.
 class ChangeEdlGenerator {
 public:
-    /// `matchBy` 1 compares clip names, all else roll names. Throws Result::InvalidArgument for an enabled VFX row that
-    /// doesn't compile.
+    /// `matchBy` 1 compares clip names, any other value roll names. Throws Result::InvalidArgument for an enabled VFX
+    /// row that doesn't compile.
     void configure(std::int32_t matchBy, const std::vector<VfxPatternEntry>& vfxEntries);
 
     /// Replaces the content of `changeEvents`; the inputs stay as they are. Returns Ok. Throws what the timecode
-    /// arithmetic throws for a valid event, Result::OutOfRange for a stretch that leaves the day.
+    /// arithmetic throws for a valid event, and Result::OutOfRange for a stretch that leaves the day.
     util::Result::Type generate(const EventList& oldEvents, const EventList& newEvents, EventList& changeEvents) const;
 
 private:

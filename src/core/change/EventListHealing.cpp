@@ -21,8 +21,7 @@ using util::Result;
 
 namespace {
 
-/// The events of `events` that stand in `selected`, in the list's order; a healed event is taken apart into its
-/// members.
+/// The events of `events` that are in `selected`, in the list's order; a healed event is taken apart into its members.
 EventList withoutHealing(const EventList& events, const CutMap& selected)
 {
     std::vector<std::shared_ptr<EventBase>> taken;
@@ -39,7 +38,7 @@ EventList withoutHealing(const EventList& events, const CutMap& selected)
     return list;
 }
 
-/// Takes the events out whose timecodes are invalid, which healing would drop.
+/// Removes the events with invalid timecodes, because healing would drop them.
 EventList takeUntimed(EventList& events)
 {
     EventList untimed;
@@ -51,7 +50,7 @@ EventList takeUntimed(EventList& events)
     return untimed;
 }
 
-/// Whether two neighbours of the selection have other events between them in the whole.
+/// Whether two neighbours in the selection have other events between them in the whole list.
 bool isFragmented(const CutMap& selected, const CutMap& whole)
 {
     using Neighbours = std::pair<std::shared_ptr<EventBase>, std::shared_ptr<EventBase>>;
@@ -71,7 +70,7 @@ HealContext makeContext(const EventList& referenceList, const Settings& settings
     return {&referenceList, &settings, Timecode::framerate()};
 }
 
-/// The event before or behind `event` in the order of DST IN; null when there is none or the list doesn't hold it.
+/// The event before or after `event` in the order of DST IN; null when there is none or the list doesn't hold it.
 std::shared_ptr<EventBase> neighbourOf(const EventList& events, const std::shared_ptr<EventBase>& event, bool previous)
 {
     const CutMap map(events, Timecode::framerate());
@@ -115,7 +114,7 @@ void EventList::heal(const EventList& selection, const EventList& referenceList,
             names.emplace_back(healedEvent, HealProcessing::healedEventName(names.size() + 1));
     }
 
-    // Nothing fails from here on.
+    // Nothing can fail from here on.
     m_events = std::move(all);
     std::uint32_t number = 1;
     for (const auto& event : m_events)

@@ -15,12 +15,12 @@ namespace cadrel::core {
 ///     GapsWithoutInserts   the gap is the same in both, and no event of the reference list lies in it
 ///     GapsWithInserts      the gap is the same in both
 ///
-/// The result is in the order of DST IN and numbered from 1; events with EventFlaw::TimecodeInvalid drop out of it.
+/// The result is in the order of DST IN and numbered from 1; events with EventFlaw::TimecodeInvalid are left out.
 class HealProcessing : public EventListAlgorithm {
 public:
     /// Leaves the list as it is when the mode is None or there are fewer than two events. Throws what the timecode
-    /// arithmetic throws, and Result::NotAvailable without a string converter; the list then keeps its events, some of
-    /// which may bear new numbers.
+    /// arithmetic throws, and Result::NotAvailable without a string converter; the list then keeps its events, but some
+    /// may have new numbers.
     void process(EventList& events, const HealContext& context) const override;
 
     /// The number of events that `process` would leave. Changes nothing; throws as `process`.

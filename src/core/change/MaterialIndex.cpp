@@ -13,8 +13,8 @@ namespace cadrel::core {
 
 namespace {
 
-/// All that twins have in common. The destination length follows from speed and source but for rounding, and decides
-/// over freeze frames.
+/// Everything that twins have in common. The destination length follows from speed and source, apart from rounding, but
+/// it is needed for freeze frames.
 auto twinKeyOf(const EventShape& shape)
 {
     return std::make_tuple(shape.srcIn, shape.srcOut, shape.dstOut - shape.dstIn, shape.transitionType,

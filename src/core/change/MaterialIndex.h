@@ -33,8 +33,9 @@ struct EventShape {
     double motionSpeed;
 };
 
-/// The old events that use the very same stretch of source in the very same way, at different places of the programme.
-/// One new event meets all of them alike, so that whatever doesn't depend on the place is worked out once for all.
+/// Twins: the old events that use exactly the same stretch of source in the same way, at different places of the
+/// programme. A new event shares the same stretch with all of them, so everything that doesn't depend on the place is
+/// worked out only once.
 struct TwinGroup {
     struct Place {
         std::int32_t dstIn;
@@ -44,7 +45,7 @@ struct TwinGroup {
     EventShape shape;                     ///< of one of them
     std::span<const Place> placesByTime;  ///< ascending by `dstIn`, then by index
     std::span<const Place> placesByIndex; ///< the same, ascending by index
-    bool areOrdersEqual;                  ///< as they are where the old list is in the order of time
+    bool areOrdersEqual;                  ///< true when the old list is in the order of time
 };
 
 /// The old events by name and source range.
@@ -54,9 +55,10 @@ public:
     MaterialIndex(const MaterialIndex&) = delete;
     MaterialIndex& operator=(const MaterialIndex&) = delete;
 
-    /// Adds the event at `index` of the list of old events. An event without source overlaps nothing and is left out.
+    /// Adds the event at `index` of the list of old events. An event without a source range overlaps nothing and is
+    /// left out.
     void add(const std::string& name, const EventShape& shape, std::size_t index);
-    /// To be called when all are added, before the first search.
+    /// Call it after all events have been added and before the first search.
     void finish();
 
     /// The groups under a name whose source range overlaps that from `srcIn` to `srcOut`.

@@ -10,8 +10,9 @@ namespace cadrel::core {
 
 std::vector<std::size_t> survivorsOfOverlaps(const std::vector<CandidateStretch>& candidates)
 {
-    // All walks go on at once: the candidates that stand so far meet the next one in the order in which they came. No
-    // two of them overlap, since one of the two would have been taken out, so they are found by their starts.
+    // All comparisons are made in one pass: the candidates that survive so far are compared with the next one, in their
+    // order. No two of them overlap, because one of the two would have been taken out. So they can be found by their
+    // starts.
     //
     //     standing     |--- 0 ---|     |-- 2 --||-- 1 --|
     //     next                |------- 3 -------|

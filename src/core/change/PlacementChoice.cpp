@@ -18,8 +18,8 @@ class PlacementChoice {
 public:
     explicit PlacementChoice(double lastDisplacement) : m_lastDisplacement(lastDisplacement) {}
 
-    /// Stretches that overlap, directly or through others, are decided between by themselves. `stretches` ascend by
-    /// their start.
+    /// Decides separately between each group of stretches that overlap, directly or through others. `stretches` ascend
+    /// by their start.
     std::vector<Placement> survivorsOf(const std::vector<const SharedStretch*>& stretches)
     {
         std::vector<const SharedStretch*> connected;
@@ -57,7 +57,7 @@ private:
             addPlacementsOfWalk(connected);
     }
 
-    /// Where all overlap each other, the walk through the list ends with the one that no other beats.
+    /// If all overlap each other, the one that no other beats survives.
     Placement bestOf(const std::vector<const SharedStretch*>& overlapping) const
     {
         std::int32_t longest = 0;
@@ -74,7 +74,8 @@ private:
         return best;
     }
 
-    /// Of candidates of one length; the later in the list wins a tie. CandidateStretch::beatsLater says the same.
+    /// For candidates of the same length; the later one in the list wins a tie. CandidateStretch::beatsLater says the
+    /// same.
     bool isNearer(const Placement& a, const Placement& b) const
     {
         const double aDistance = distance(*a.stretch, a.place.dstIn);
@@ -82,8 +83,8 @@ private:
         return aDistance != bDistance ? aDistance < bDistance : a.place.index > b.place.index;
     }
 
-    /// The displacement falls as the old place rises, so the nearest to the last one stands on either side of where it
-    /// falls below that. `places` ascends by time and is not empty.
+    /// The displacement falls as the old place rises, so the place nearest to the last displacement is just before or
+    /// just after the point where it falls below that. `places` ascends by time and is not empty.
     TwinGroup::Place nearestPlace(const SharedStretch& stretch, std::span<const TwinGroup::Place> places) const
     {
         const auto below = std::partition_point(places.begin(), places.end(), [&](const TwinGroup::Place& place) {
@@ -100,8 +101,8 @@ private:
         return isNearer(nearestAbove, nearestBelow) ? nearestAbove.place : nearestBelow.place;
     }
 
-    /// Walks through the candidates in list order. Twins with no other candidate between them overlap each other and
-    /// the same others, so that the best of such a run stands for all of it.
+    /// Goes through the candidates in list order. Twins with no other candidate between them overlap each other and the
+    /// same others, so only the best of such a run is kept.
     void addPlacementsOfWalk(const std::vector<const SharedStretch*>& connected)
     {
         const std::vector<Placement> runs = bestOfRuns(connected);

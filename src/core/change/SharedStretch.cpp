@@ -36,7 +36,7 @@ SharedStretch::SharedStretch(const TwinGroup& group, const EventShape& newEvent,
     m_length = std::min(old.srcOut, newEvent.srcOut) - sourceStart;
 
     if (EventBase::areSameSpeed(old.motionSpeed, FreezeSpeed)) {
-        // The one picture stands still, so the stretch begins where the events begin.
+        // A freeze frame shows one picture, so the stretch begins where the events begin.
         m_length = std::min(old.dstOut - old.dstIn, newEvent.dstOut - newEvent.dstIn);
         m_startAfterOldDstIn = 0;
         m_startInNew = newEvent.dstIn;

@@ -9,8 +9,8 @@
 
 namespace cadrel::core {
 
-/// The stretch of source that a new event shares with the old events of a group of twins, in frames. It is the same for
-/// every twin but for the place in the old programme.
+/// The stretch of source that a new event shares with the old events of a group of twins, in frames. Only its place in
+/// the old programme differs from twin to twin.
 ///
 ///     source           |------ old event -----|
 ///                             |----- new event ------|
@@ -18,8 +18,8 @@ namespace cadrel::core {
 ///     offsetOld        |----->|
 class SharedStretch {
 public:
-    /// `group` and `newEvent` are played alike and their source ranges overlap. Throws Result::OutOfRange when the
-    /// change event would leave the day for one of the twins.
+    /// `group` and `newEvent` have the same transition and speed, and their source ranges overlap. Throws
+    /// Result::OutOfRange when the change event would leave the day for one of the twins.
     SharedStretch(const TwinGroup& group, const EventShape& newEvent, const Framerate& framerate);
 
     const TwinGroup& group() const { return *m_group; }

@@ -31,7 +31,7 @@ Timecode limited(const Timecode& length, const Timecode& start, const Timecode& 
     return start + length > end ? end - start : length;
 }
 
-/// How much source the transition takes. A fast event gets a shorter piece, which is what the division means to do.
+/// How much source the transition takes. A fast event gets a shorter piece; the division is deliberate.
 Timecode transitionSourceLength(const EventBase& event)
 {
     Timecode length(event.transitionDuration());

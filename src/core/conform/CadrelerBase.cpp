@@ -48,7 +48,7 @@ std::vector<Detection> detections(const Settings& settings)
     return found;
 }
 
-/// Runs steps one after the other up to the first that fails, by its code or by throwing one.
+/// Runs the steps one after the other, up to the first that returns or throws a failure.
 template <typename... Steps>
 Result::Type inTurn(Steps... steps)
 {

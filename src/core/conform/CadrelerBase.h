@@ -22,8 +22,8 @@ class MediaPoolInterface;
 class ProgressHandlerBase;
 class Settings;
 
-/// The contract between the logic and whatever holds the material. This class implements the run itself in terms of
-/// operations on the project, which a subclass implements; it knows nothing of tracks or transactions.
+/// The engine. It implements a run in terms of operations on the project, which a subclass implements. It knows nothing
+/// of tracks or transactions.
 ///
 /// A run turns each change event into a Cut, trims the cuts around snippets, applies them one after the other and
 /// writes markers. A preview does the same with a selection of events in a temporary place of the project.
@@ -37,23 +37,24 @@ public:
 
     /// Requests a run of the change list and returns at once.
     virtual util::Result::Type startCadrel() = 0;
-    /// Previews `events`: as `run`, but only with the markers that reach into the stretch from the start of the first
-    /// event to the end of the last that isn't left out, without completeCadrel, and for no events without markers at all. `first` and
-    /// `last` are the numbers of neighbours at either end, `options` is the state of the destination toggle. A subclass
-    /// overrides it to request a preview, and calls this one when the time has come.
+    /// Previews `events`. It does what `run` does, except that it doesn't call completeCadrel. It writes only markers
+    /// that reach into the stretch from the start of the first event to the end of the last event that isn't left out.
+    /// Without events it writes no markers. `first` and `last` are the numbers of neighbours at either end, `options`
+    /// is the state of the destination toggle. A subclass overrides it to request a preview, and calls this one later
+    /// to carry it out.
     virtual util::Result::Type startPreview(const EventList& events, std::uint64_t first, std::uint64_t last,
                                             std::uint32_t options);
     /// Sets the cycle to the span of the events; arguments as of startPreview.
     virtual util::Result::Type cycleToEvents(const EventList& events, std::uint64_t first, std::uint64_t last,
                                              std::uint32_t options) = 0;
-    /// These cycles and positions are seconds from the start of the project, wherever its clock begins.
+    /// These cycles and positions are seconds from the start of the project, not times of its clock.
     virtual util::Result::Type getProjectCycle(double& left, double& right) = 0;
     virtual util::Result::Type setProjectCycle(double left, double right) = 0;
     virtual util::Result::Type getTransportCycle(double& left, double& right) = 0;
     virtual util::Result::Type setTransportCycle(double left, double right) = 0;
     virtual util::Result::Type getTransportPosition(double& seconds) = 0;
     virtual util::Result::Type setTransportPosition(double seconds) = 0;
-    /// Takes the preview back: here removeVirginTerritoryMarkers alone.
+    /// Takes the preview back. This class only calls removeVirginTerritoryMarkers.
     virtual util::Result::Type endPreview();
     /// The path of the project's file.
     virtual std::wstring getProjectName() = 0;
@@ -61,7 +62,7 @@ public:
     virtual MediaPoolInterface* getMediaPool() = 0;
     /// In seconds.
     virtual double getTimeOrigin() = 0;
-    /// Switches the preview on or off. Switched off, what it wrote goes.
+    /// Switches the preview on or off. Switching it off removes what it wrote.
     virtual void setPreviewActive(bool active) = 0;
     virtual bool isPreviewActive() = 0;
 
@@ -75,18 +76,18 @@ public:
     virtual util::Result::Type processEvent(Cut& cut) = 0;
     /// One cut event for each candidate track, with the four times of the change event in seconds. Never null.
     virtual std::shared_ptr<Cut> makeCutEvents(const std::shared_ptr<EventBase>& changeEvent) = 0;
-    /// Applies the change list. Events with EventFlaw::TimecodeInvalid are left out without a word. A step that fails,
-    /// by its code or by throwing one, ends the run with that code and leaves the project as it then is.
+    /// Applies the change list. Events with EventFlaw::TimecodeInvalid are left out silently. If a step returns or
+    /// throws a failure, the run ends with that code, and the project stays as it is then.
     virtual util::Result::Type run(const EventList& changeList) final;
-    /// Closes the project after all cuts.
+    /// The last step of a run: puts the new programme in the place of the old one.
     virtual util::Result::Type completeCadrel() = 0;
     /// Writes markers, each on the marker track of its kind.
     virtual util::Result::Type generateMarkers(const std::vector<MarkerEntry>& entries) = 0;
-    /// What the run's algorithms may know; valid as long as the project isn't edited otherwise.
+    /// What the run's algorithms may know. It is valid until somebody else edits the project.
     virtual CadrelRunState getRunState() = 0;
     virtual CadrelPreviewState getPreviewState() = 0;
-    /// Applies the cuts in the order of the list, up to the first that fails. A subclass that has a stage of its own
-    /// overrides it and calls this one first.
+    /// Applies the cuts in the order of the list, up to the first that fails. A subclass can add a stage of its own: it
+    /// overrides this operation and calls it first.
     virtual util::Result::Type applyVirginTerritories(CutList& cuts);
     /// Replaces the list of events that the project holds as previewed.
     virtual util::Result::Type setProjectEvents(const EventList& events) = 0;

@@ -45,7 +45,7 @@ void adjustStart(CutEventBase& range, const CadrelPreviewState& state)
     }
 }
 
-/// A short piece behind the range comes along, a short piece at its end stays out. Returns whether the range has grown.
+/// A short piece after the range comes along, a short piece at its end stays out. Returns whether the range has grown.
 bool adjustEnd(CutEventBase& range, const CadrelPreviewState& state)
 {
     const SecondsRange clip = range.update(range.srcOut()).across;
@@ -65,7 +65,7 @@ bool adjustEnd(CutEventBase& range, const CadrelPreviewState& state)
     return false;
 }
 
-/// Makes the cuts from `next` on give way on a track to a range whose end has grown over them.
+/// The end of a range has grown over the cuts from `next` on: makes them give way on that track.
 ///
 ///     grown     |---------------|
 ///     next              |-|            swallowed

@@ -17,7 +17,7 @@ struct AutomationState {
     double rightValue = -1.0;
 };
 
-/// What stands on a track around a time. A range with `start` equal to `end` means no host event.
+/// What is on a track at a time. A range with `start` equal to `end` means that there is no host event.
 struct CutEventSpans {
     SecondsRange across;
     SecondsRange before;

@@ -29,8 +29,8 @@ public:
     /// In seconds, over all cuts. Throw Result::OutOfRange for an empty list and for a cut without cut events.
     double earliestDstIn() const;
     double latestDstOut() const;
-    /// The cuts by their earliestDstIn; of two at the same time the later one of the list. Throws Result::OutOfRange
-    /// for a cut without cut events.
+    /// The cuts by their earliestDstIn. Of several with the same time, the result has only the last one of the list.
+    /// Throws Result::OutOfRange for a cut without cut events.
     std::map<double, std::weak_ptr<Cut>> orderedByStart() const;
 
 private:

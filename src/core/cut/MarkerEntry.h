@@ -7,7 +7,7 @@
 
 namespace cadrel::core {
 
-/// What a marker points out. Each kind has a marker track of its own.
+/// What a marker points out. Each kind has a marker track of its own; see MarkerTrack.h.
 struct MarkerKind {
     enum Type : std::int32_t {
         Insert = 1,

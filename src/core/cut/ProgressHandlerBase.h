@@ -7,7 +7,7 @@
 
 namespace cadrel::core {
 
-/// Shows the user how far a run is, and tells whether he has cancelled it.
+/// Shows the user how far a run has come, and says whether the user has cancelled it.
 class ProgressHandlerBase {
 public:
     virtual ~ProgressHandlerBase() = default;

@@ -19,8 +19,8 @@ namespace {
 
 using Automation = std::map<std::int32_t, AutomationState>;
 
-/// A larger step of a curve can be heard. Values from 0 to 1 that a host holds as 32-bit floats differ by up to the
-/// rounding more than they should.
+/// A larger step of a curve can be heard. Values from 0 to 1 that a host stores as 32-bit floats may differ a little
+/// more, because of rounding.
 constexpr double LargestSmoothStep = 0.01;
 constexpr double ValueRounding = 1e-7;
 
@@ -29,8 +29,8 @@ struct Point {
     double value;
 };
 
-/// The value of a curve, held before its first and behind its last point; nothing for a curve without points. Of two
-/// points at one time the left one comes first.
+/// The value of a curve, held before its first and after its last point; nothing for a curve without points. Of two
+/// points at the same time the left one comes first.
 std::optional<double> valueAt(const AutomationState& state, double time)
 {
     const auto isPoint = [](const Point& point) { return point.time != -1.0 || point.value != -1.0; };
@@ -51,7 +51,7 @@ std::optional<double> valueAt(const AutomationState& state, double time)
     return a.value + (b.value - a.value) * (time - a.time) * (1.0 / (b.time - a.time));
 }
 
-/// Whether some curve that both have has another value in the first at `timeA` than in the second at `timeB`.
+/// Whether some curve that both have has a different value in the first at `timeA` and in the second at `timeB`.
 bool jumps(const Automation& a, double timeA, const Automation& b, double timeB)
 {
     return std::any_of(a.begin(), a.end(), [&](const auto& curve) {
@@ -64,14 +64,14 @@ bool jumps(const Automation& a, double timeA, const Automation& b, double timeB)
     });
 }
 
-/// Whether the one follows the other in the new programme without a frame between them.
+/// Whether the second follows the first in the new programme without a frame between them.
 bool meet(const EventBase& previous, const EventBase& current)
 {
     return current.dstIn() >= previous.dstOut() && current.dstIn() - previous.dstOut() < Timecode(0, 0, 0, 1);
 }
 
-/// The marker of all tracks on which a curve jumps from one cut to the next; nothing without such a track. Reports a
-/// step for each track.
+/// One marker for all tracks on which a curve jumps from one cut to the next; nothing if there is no such track.
+/// Reports a step for each track.
 template <typename Report>
 std::optional<MarkerEntry> warningBetween(const Cut& previous, const Cut& current, Report reportStep)
 {

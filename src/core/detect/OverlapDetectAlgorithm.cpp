@@ -20,7 +20,7 @@ bool holdsMaterial(CutEventBase& cutEvent, double time)
     return clip.start != clip.end;
 }
 
-/// Whether both run into the other's range with material.
+/// Whether both have material in the other's range.
 bool collide(CutEventBase& p, CutEventBase& q)
 {
     if (!(p.dstOut() > q.dstIn()))
@@ -29,7 +29,7 @@ bool collide(CutEventBase& p, CutEventBase& q)
     return holdsMaterial(p, p.srcOut() - overlap) && holdsMaterial(q, q.srcIn() + overlap);
 }
 
-/// The marker of all tracks on which one cut runs into the next; nothing without such a track.
+/// One marker for all tracks on which one cut runs into the next; nothing if there is no such track.
 std::optional<MarkerEntry> overlapOf(const Cut& previous, const Cut& current)
 {
     MarkerEntry entry{std::numeric_limits<double>::max(), 0.0, util::StringUtil::toUtf8(L"Overlap in "),

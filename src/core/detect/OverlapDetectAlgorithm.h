@@ -6,7 +6,7 @@
 
 namespace cadrel::core {
 
-/// Finds where two ranges want the same place of a track and both bring material there.
+/// Finds places on a track to which two ranges both bring material.
 class OverlapDetectAlgorithm : public CadrelInformationAlgorithm {
 public:
     std::vector<MarkerEntry> detect(const CutList& cuts, const CadrelRunState& state,

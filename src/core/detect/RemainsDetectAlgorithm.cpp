@@ -47,7 +47,7 @@ bool areSame(const SecondsRange& a, const SecondsRange& b)
     return std::abs(a.start - b.start) < SameInstant && std::abs(a.end - b.end) < SameInstant;
 }
 
-/// One range where a piece fills the whole of the cut event.
+/// Only one range if a piece fills the whole cut event.
 std::vector<SecondsRange> remaindersOf(CutEventBase& cutEvent, double longest)
 {
     std::vector<SecondsRange> remainders;

@@ -6,7 +6,7 @@
 
 namespace cadrel::core {
 
-/// Finds short pieces of audio clips at the very edges of the ranges that were carried over.
+/// Finds short pieces of audio clips at either edge of the ranges that were carried over.
 class RemainsDetectAlgorithm : public CadrelInformationAlgorithm {
 public:
     /// Pieces of up to `threshold` frames are reported.

@@ -35,7 +35,7 @@ Transitions transitionsOf(const EventList& events)
     return found;
 }
 
-/// Removes those of `events` at whose place in the programme one of `others` stands.
+/// Removes the events that have the same place in the programme as one of `others`.
 void removeThoseAtPlacesOf(Transitions others, Transitions& events)
 {
     std::sort(others.begin(), others.end(), standsEarlier);

@@ -6,8 +6,8 @@
 
 namespace cadrel::core {
 
-/// Finds the dissolves and wipes of the new EDL that stand at no such place in the old one and lie inside no change
-/// event. A marker is as long as the transition, whose duration must lie within a day. Can't be cancelled.
+/// Finds the dissolves and wipes of the new EDL that the old one doesn't have at that place, and that aren't inside a
+/// change event. A marker is as long as the transition, whose duration must lie within a day. Can't be cancelled.
 class TransitionDetectAlgorithm : public CadrelInformationAlgorithm {
 public:
     std::vector<MarkerEntry> detect(const CutList& cuts, const CadrelRunState& state,

@@ -17,7 +17,7 @@ namespace {
 
 using WeakEvents = std::vector<std::weak_ptr<EventBase>>;
 
-/// Sorts what mostly comes in order already; equal elements keep their order.
+/// Sorts a list that is mostly in order already. Equal elements keep their order.
 template <typename Range, typename Less>
 void sortStably(Range& range, Less less)
 {
@@ -52,7 +52,7 @@ bool shareMoreThanAPoint(const SecondsRange& a, const SecondsRange& b)
     return std::max(a.start, b.start) < std::min(a.end, b.end);
 }
 
-/// What remains of `range` around `covered`.
+/// The parts of `range` before and after `covered`.
 std::vector<SecondsRange> subtract(const SecondsRange& range, const SecondsRange& covered)
 {
     std::vector<SecondsRange> rest;

@@ -22,9 +22,10 @@ struct CutEntry {
     std::weak_ptr<EventBase> event;
 };
 
-/// A sorted, read-only view of one EventList for a moment: the events in time order, those that touch a stretch of
-/// time, and the parts of it that none covers, on either side. It follows no changes of the list. Events with
-/// EventFlaw::TimecodeInvalid are left out, since their seconds can't be computed; every other flaw leaves an event in.
+/// A sorted, read-only view of one EventList. It gives the events in time order, the events that touch a stretch of
+/// time, and the parts of a stretch that no event covers, in the source or in the destination. It doesn't follow
+/// changes of the list. Events with EventFlaw::TimecodeInvalid are left out, since their seconds can't be computed;
+/// every other flaw leaves an event in.
 class CutMap {
 public:
     /// Throws what Timecode::toSeconds throws under `framerate`.
@@ -41,9 +42,9 @@ public:
     SecondsRange sourceSpan() const { return span(m_sourceEdges); }
     SecondsRange destinationSpan() const { return span(m_destinationEdges); }
 
-    /// The events with an edge from `start` to `end` seconds, both included, in the order of the edges; an event whose
-    /// two edges have another event's between them stands twice. When there is no such edge, the event around the range.
-    /// Empty unless `start` is less than `end`.
+    /// The events with an edge from `start` to `end` seconds, both included, in the order of the edges; if another
+    /// event's edge is between the two edges of an event, that event is in the result twice. If no edge is in the
+    /// range, the result is the event around the range. Empty unless `start` is less than `end`.
     std::vector<std::weak_ptr<EventBase>> eventsInSourceRange(double start, double end) const;
     std::vector<std::weak_ptr<EventBase>> eventsInDestinationRange(double start, double end) const;
 
@@ -52,8 +53,8 @@ public:
     std::vector<SecondsRange> uncoveredSourceRanges(const SecondsRange& range) const;
     std::vector<SecondsRange> uncoveredDestinationRanges(const SecondsRange& range) const;
 
-    /// Whether one of the events that eventsInDestinationRange answers covers the whole range, under the provider's
-    /// rate; throws what Timecode::toSeconds throws.
+    /// Whether one of the events of eventsInDestinationRange covers the whole range, under the provider's rate; throws
+    /// what Timecode::toSeconds throws.
     bool isDestinationRangeInsideAnEvent(const SecondsRange& range) const;
 
 private:

@@ -278,7 +278,7 @@ void EventBase::updateFlaws(bool timecodesValid)
 
 void EventBase::updateMotionSpeed(const Framerate& framerate)
 {
-    // Frames can't be counted at a rate that isn't known to be non-drop, except at 30 frames.
+    // Frames can only be counted at a rate that is known to be non-drop, or at 30 frames.
     if (framerate.dropFrame != 0 && framerate.framesPerSecond != 30)
         return;
     if (m_srcOut == m_srcIn) {

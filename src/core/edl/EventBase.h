@@ -51,23 +51,22 @@ struct TransitionType {
 };
 
 /// One event of an edit decision list: a stretch of source material, the place in the programme where it plays, a
-/// transition and a few names. It keeps track of its own flaws and of its motion speed, both of which follow from the
-/// four timecodes under the provider's rate. Setters of timecodes therefore throw Result::NotAvailable without a
-/// FramerateProvider.
+/// transition and a few names. It works out its own flaws and its motion speed from the four timecodes and the
+/// provider's rate. Setters of timecodes therefore throw Result::NotAvailable without a FramerateProvider.
 ///
-/// The getters return references, which follow the changes of the event: copy what has to outlive a setter.
+/// The getters return references, which change with the event. Copy a value that you need after a setter.
 ///
 /// Every setter notifies with the event's own context after the change, except setEventNumber, setComment, addFlaw and
 /// removeFlaw, which are called in bulk or before anyone listens.
 class EventBase : public serialize::Serializable, public ChangeContextNotificationBase {
 public:
-    /// An event that has flaw 0 alone.
+    /// An event that has only flaw 0.
     EventBase();
     /// A copy as by assignment, without listeners.
     EventBase(const EventBase& other);
-    /// Copies everything but the listeners and the text of flaw 1, without a notification and without looking at the
-    /// flaws anew: the timecodes count as initialized from here on, while flaw 0 stays in a copied set until the next
-    /// change of a timecode.
+    /// Copies everything but the listeners and the text of flaw 1, without a notification and without working out the
+    /// flaws again. The timecodes then count as initialized, but flaw 0 stays in a copied set until the next change of
+    /// a timecode. This is deliberate.
     EventBase& operator=(const EventBase& other);
     ~EventBase() override = default;
 
@@ -104,7 +103,7 @@ public:
     bool hasFormatFlaw() const;
     /// The messages of all flaws, translated, a line each. Throws Result::NotAvailable without a string converter.
     std::string flawsText() const;
-    /// Speeds that are closer than 0.01 count as one.
+    /// Speeds that differ by less than 0.01 count as equal.
     static bool areSameSpeed(double a, double b);
     bool hasSpeed(double speed) const { return areSameSpeed(m_motionSpeed, speed); }
     bool isNormalSpeed() const { return hasSpeed(1.0); }
@@ -121,13 +120,13 @@ public:
     void setSrcOut(const Timecode& srcOut);
     void setDstIn(const Timecode& dstIn);
     void setDstOut(const Timecode& dstOut);
-    /// These take copies, so that an event's own timecodes may change places.
+    /// These take copies, so that the arguments may be the event's own timecodes.
     void setSrc(Timecode in, Timecode out);
     void setDst(Timecode in, Timecode out);
     void setIn(Timecode srcIn, Timecode dstIn);
     void setOut(Timecode srcOut, Timecode dstOut);
     void setTimecodes(Timecode srcIn, Timecode srcOut, Timecode dstIn, Timecode dstOut);
-    /// Looks at the flaws and the motion speed anew, for a changed frame rate, and notifies.
+    /// Works out the flaws and the motion speed again, after a change of the frame rate, and notifies.
     void revalidate();
 
     void setEventNumber(std::uint32_t number) { m_eventNumber = number; }

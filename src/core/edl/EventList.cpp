@@ -72,7 +72,7 @@ EventList& EventList::operator=(const EventList& other)
 {
     if (this == &other)
         return *this;
-    // The other list may live in one of the own events, a healed one, which ends with them.
+    // The other list may belong to a healed event of this list, and would be destroyed with it.
     Events shared = other.m_events;
     stopListening();
     std::swap(m_events, shared);
@@ -220,7 +220,7 @@ void EventList::copyFrom(const EventList& other)
 
 void EventList::mergeFrom(const EventList& other)
 {
-    // The places of the own events with the same timecodes, the first one last, where it is taken from.
+    // The places of this list's events with the same timecodes, in reverse order, because they are taken from the end.
     std::map<TimecodeKey, std::vector<std::size_t>> places;
     for (std::size_t index = size(); index-- > 0;)
         places[timecodeKeyOf(at(index))].push_back(index);
@@ -322,7 +322,7 @@ void EventList::write(ByteArchive& archive) const
 {
     archive.writeCount(size());
     for (const auto& event : m_events) {
-        // A plain copy of a healed event bears its kind, but not its body.
+        // A plain copy of a healed event has its kind, but not its body.
         const bool isHealed = dynamic_cast<const HealedEvent*>(event.get()) != nullptr;
         archive << static_cast<std::uint32_t>(isHealed ? EventKind::Healed : EventKind::Plain);
         archive << *event;

@@ -28,12 +28,11 @@ struct ListKind {
 enum class ListSide : std::int32_t { Source = 0, Destination = 1 };
 
 /// An ordered sequence of shared events: the old, the new and the change EDL, the members of a healed event, any
-/// selection. The order is that of arrival; duplicates are allowed. A list listens to its events and re-announces their
-/// changes as one change of the list.
+/// selection. Events stay in the order in which they were added; duplicates are allowed. A list listens to its events,
+/// and announces their changes as changes of the list.
 ///
 /// A bulk edit stops listening to the events, does its work, listens again and sends one EventListChangeContext with
-/// the list's kind. What has been done before a failure stays, and a list whose bulk edit failed has stopped
-/// listening to its events.
+/// the list's kind. After a failure, what was done before it stays, and the list no longer listens to its events.
 class EventList : public serialize::Serializable,
                   public ChangeContextNotificationBase,
                   public ChangeContextListenerInterface {
@@ -80,31 +79,32 @@ public:
     void remove(const EventList& other);
     /// Notifies also when the list was empty.
     void clear();
-    /// Listens to all events or to none, without a notification, for a caller's own bulk edit.
+    /// Makes the list listen to all events or to none, without a notification, for a caller's own bulk edit.
     void setListening(bool flag);
-    /// Gives the events away and is empty then, without a notification.
+    /// Returns the events and leaves the list empty, without a notification.
     std::vector<std::shared_ptr<EventBase>> release();
     /// Replaces the content by copies of the other's events, in two notifications. Each copy is a plain EventBase made
-    /// by assignment, so that a healed event keeps its kind and loses its members.
+    /// by assignment, so that a healed event keeps its kind but loses its members.
     void copyFrom(const EventList& other);
-    /// Replaces the content by the other's, but keeps the own events that have the four timecodes of one of the
-    /// other's: first the kept ones in the order of `other`, then the added ones, a notification each.
+    /// Replaces the content by the other's, but keeps each of this list's events that has the same four timecodes as
+    /// one of the other's. The kept ones come first, in the order of `other`, then the added ones, with a notification
+    /// each.
     void mergeFrom(const EventList& other);
     /// Moves all valid events by `offset`, towards the end of the day when `forward`. Throw Result::OutOfRange, with
     /// nothing changed, when the list's range would leave the day, and what sourceRange throws.
     void shiftSource(const Timecode& offset, bool forward) { shift(ListSide::Source, offset, forward); }
     void shiftDestination(const Timecode& offset, bool forward) { shift(ListSide::Destination, offset, forward); }
 
-    /// Reads a CMX EDL behind the present events, or in their place when not `append`. `framerate` receives the rate
-    /// that the file shows. `renameBRolls` gives a roll whose name without its last letter "B" is in the file that
-    /// shorter name. Throws what the reader returns, Result::FileAccessFailed for a file that can't be read; the list
-    /// stays cleared when not `append`.
+    /// Reads a CMX EDL. Its events come after the present ones with `append`, otherwise they replace them. `framerate`
+    /// receives the rate that the file shows. With `renameBRolls`, a roll "A001B" is named "A001" when the file also
+    /// has a roll "A001". Throws what the reader returns, such as Result::FileAccessFailed for a file that can't be
+    /// read; without `append` the list is empty then.
     void load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
               bool acceptAudioChannels);
     /// Without renaming B-rolls and without audio.
     void load(const std::wstring& fileName, bool append);
-    /// Writes a CMX EDL, or several where there are more events than one file can hold; see fileio::CmxWriter. Throws
-    /// what the writer returns.
+    /// Writes a CMX EDL, or several if there are more events than one file can hold; see fileio::CmxWriter. Throws what
+    /// the writer returns.
     void save(const std::wstring& fileName) const;
 
     /// Marks each event as a VFX shot or not by its roll name, or its clip name when `matchBy` is 1. One notification,
@@ -113,21 +113,21 @@ public:
     /// One notification, and none when nothing changed.
     void clearVfx();
 
-    /// Undoes earlier healing of the selected events and heals them anew by `healMode` (Settings::HealMode) against
-    /// the inserts of `referenceList`. The list is sorted by DST IN and numbered from 1 afterwards, the healed events
-    /// named by their order. Members of a healed event whose timecodes have become invalid are kept as they are. Throws
-    /// what HealProcessing throws; no event is lost then.
+    /// Undoes the healing of the selected events and heals them again by `healMode` (HealMode), with the inserts of
+    /// `referenceList`. The list is sorted by DST IN and numbered from 1 afterwards, the healed events named by their
+    /// order. A member of a healed event is kept as it is if its timecodes have become invalid. Throws what
+    /// HealProcessing throws; no event is lost then.
     void heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode);
     /// Whether `heal` would change the number of events. Changes nothing. False for a selection with gaps in this list.
     bool canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const;
-    /// Extends an event to the end of the one before it, or to the start of the one behind it, by the same length on
-    /// both sides. Does nothing without such a neighbour. Throws Result::OutOfRange when the two overlap or the source
-    /// would leave the day, with the event unchanged.
+    /// Extends an event to the end of the one before it, or to the start of the one after it, by the same length on
+    /// both sides. Does nothing if there is no such neighbour. Throws Result::OutOfRange when the two overlap or the
+    /// source would leave the day, with the event unchanged.
     void extendEvent(const std::shared_ptr<EventBase>& event, bool previous);
-    /// Whether there is a neighbour with a gap between; never throws.
+    /// Whether there is a neighbour and a gap between the two; never throws.
     bool canExtendEvent(const std::shared_ptr<EventBase>& event, bool previous) const;
 
-    /// Answers an event's change with the list's own context; all else is ignored.
+    /// Sends the list's own context when an event changes; ignores everything else.
     void onChange(const ChangeContext& context) override;
 
     /// Throws Result::CorruptData for an unknown kind of event, and what the events throw.

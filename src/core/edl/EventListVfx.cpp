@@ -10,7 +10,7 @@ namespace cadrel::core {
 
 namespace {
 
-/// Gives each event the flag that `isVfx` has for it; whether any event changed.
+/// Gives each event the flag that `isVfx` has for it. Returns whether any event changed.
 template <class Predicate>
 bool setVfxFlags(const std::vector<std::shared_ptr<EventBase>>& events, Predicate isVfx)
 {

@@ -7,7 +7,7 @@
 
 namespace cadrel::core {
 
-/// An ordered set of flaw numbers. The numbers that exist fit into one word; a stream may bring any others.
+/// An ordered set of flaw numbers. The existing flaws fit into one word, but a stream may contain any number.
 class FlawSet {
 public:
     bool isEmpty() const { return m_common == 0 && m_others.empty(); }

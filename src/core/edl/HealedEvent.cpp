@@ -40,7 +40,7 @@ HealedEvent::HealedEvent() : EventBase(EventKind::Healed), m_healedEvents(ListKi
 
 HealedEvent::~HealedEvent()
 {
-    // Healed events may stand within each other to any depth: take them apart in a loop, not by recursion.
+    // Healed events may be nested to any depth, so they are taken apart in a loop and not by recursion.
     std::vector<std::shared_ptr<EventBase>> orphans = m_healedEvents.release();
     while (!orphans.empty()) {
         const std::shared_ptr<EventBase> orphan = std::move(orphans.back());

@@ -11,7 +11,7 @@ namespace cadrel::core {
 /// included.
 class HealedEvent : public EventBase {
 public:
-    /// How many healed events may stand within each other in a stream, the outermost included.
+    /// How many levels of healed events a stream may have, with the outermost one.
     static constexpr int DeepestNesting = 8;
 
     HealedEvent();
@@ -19,12 +19,12 @@ public:
     HealedEvent& operator=(const HealedEvent&) = default;
     ~HealedEvent() override;
 
-    /// Adds a member, shared, and widens this event over it, without a notification of this event.
+    /// Adds a shared member and widens this event to span it. This event sends no notification.
     void addEvent(std::shared_ptr<EventBase> event);
     EventList& healedEvents() { return m_healedEvents; }
     const EventList& healedEvents() const { return m_healedEvents; }
 
-    /// Reading and writing throw Result::CorruptData where the nesting goes beyond DeepestNesting.
+    /// Reading and writing throw Result::CorruptData when there are more levels than DeepestNesting.
     void readCurrent(serialize::ByteArchive& archive) override;
     void write(serialize::ByteArchive& archive) const override;
     void readOlder(serialize::ByteArchive& archive, std::uint32_t version) override;

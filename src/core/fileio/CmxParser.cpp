@@ -74,8 +74,8 @@ struct OpenEvent {
     }
 };
 
-/// Collects the events of a file in their order and gives them their comment lines. Of two lines with one number, as a
-/// transition has them, the comments name the clip of the first line by FROM CLIP and that of the second by TO CLIP.
+/// Collects the events of a file in their order, with their comment lines. A transition has two lines with the same
+/// number: FROM CLIP in its comments names the clip of the first line, and TO CLIP that of the second.
 class EventCollector {
 public:
     /// The event that the next line is read into.
@@ -91,7 +91,7 @@ public:
         return *m_current.event;
     }
 
-    /// Takes the event that was begun into the list.
+    /// Adds the event that was begun to the list.
     void accept(std::string_view line)
     {
         m_current.comment = line;
@@ -110,7 +110,7 @@ public:
             m_current.applyComment(line);
     }
 
-    /// All events of the file, which has ended.
+    /// All events, once the file has ended.
     std::vector<std::shared_ptr<EventBase>> end()
     {
         close(m_previous);
@@ -124,7 +124,7 @@ public:
 private:
     static void close(const OpenEvent& open) { open.event->setComment(open.comment); }
 
-    // The first event of a file has no previous one; an event outside the list, of number 0, stands in for it.
+    // The first event of a file has no previous one, so an event with number 0 outside the list takes its place.
     OpenEvent m_previous;
     OpenEvent m_current;
     bool m_isPending = false;
@@ -211,7 +211,7 @@ void CmxParser::readFrameCountMode(std::string_view line)
         m_dropFrameState = 1;
 }
 
-/// False for a line that makes no event, for want of columns or of a provider for the timecodes.
+/// False for a line that makes no event, because it has too few columns or the timecodes have no provider.
 bool CmxParser::parseEventLine(std::string_view line, bool acceptAudio, EventBase& event)
 try {
     using Setter = void (EventBase::*)(const Timecode&);

@@ -17,9 +17,9 @@ class EventBase;
 
 namespace cadrel::core::fileio {
 
-/// Reads CMX EDLs. It is forgiving about the file and strict about each field: a line that is neither an event nor a
-/// comment is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. Only an event
-/// line with too few columns disappears.
+/// Reads CMX EDLs. It skips what it doesn't know, but checks each field: a line that is neither an event nor a comment
+/// is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. Only an event line
+/// with too few columns disappears.
 ///
 ///     FCM: NON-DROP FRAME
 ///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
@@ -29,7 +29,7 @@ namespace cadrel::core::fileio {
 ///     * FROM CLIP NAME: SC12_TK3
 ///     * TO CLIP NAME: SC14_TK1
 ///
-/// Lines end with CR where a CR comes before the first LF, else with LF.
+/// Lines end with CR if a CR comes before the first LF, otherwise with LF.
 class CmxParser : public ParserInterface {
 public:
     using ParserInterface::parse;
@@ -39,9 +39,9 @@ public:
     /// Reads the file for its rate alone: `framerate` becomes what `parse` would give. Returns as `parse`.
     util::Result::Type detect(const std::wstring& path, Framerate& framerate);
 
-    /// The rate by what has been read: drop-frame 30 where the last parsed file says drop-frame, else the least nominal
-    /// rate that holds the highest frames field below 60 that this parser has seen, with the drop-frame state of the
-    /// last file's "FCM" lines. Unknown when nothing shows it. Pulled-down rates are never detected.
+    /// The rate that the files show. It is drop-frame 30 if the last file says drop-frame. Otherwise it is the lowest
+    /// nominal rate for the highest frames field below 60 that this parser has seen, with the drop-frame state of the
+    /// last file's "FCM" lines. It is unknown when nothing shows it. Pulled-down rates are never detected.
     Framerate detectedFramerate() const;
 
 private:

@@ -73,7 +73,7 @@ void writeOne(const std::wstring& path, Events events)
     file.commit();
 }
 
-/// All files are written before the first one is put in place, and all are taken back when that fails for one.
+/// All files are written before the first one is put in place. If that fails for one of them, all are taken back.
 void writeSeveral(const std::wstring& path, Events events)
 {
     std::deque<FileReplacement> files;
@@ -99,8 +99,8 @@ bool isDigit(char character)
 ///     S H O T _ L O N G N A M E _ 1 2
 ///     S H O T _ - 1 2
 ///
-/// The first four characters never count as ending digits. Where the digits reach back to them, the "-" takes the place
-/// of the foremost digit. Digits and "-" that would come to stand in front of the name are dropped.
+/// The first four characters never count as ending digits. If the digits reach back to them, the "-" replaces the first
+/// digit. Digits and a "-" that would come before the start of the name are dropped.
 std::string keepEndingDigits(const std::string& name)
 {
     constexpr std::ptrdiff_t FirstThatCounts = 4;

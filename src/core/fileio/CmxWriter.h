@@ -16,11 +16,11 @@ namespace cadrel::core::fileio {
 ///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
 ///
 /// A list of more than 999 events goes into several files, "name_1.edl", "name_2.edl" and so on, each numbered from 1.
-/// A file is written beside its target and takes its place when all is written, so that a failure leaves what stood
-/// there; a target that is no regular file is written directly.
+/// A file is written next to its target and takes its place when it is complete, so that a failure leaves the old file
+/// as it was. A target that isn't a regular file is written directly.
 class CmxWriter : public WriterInterface {
 public:
-    /// What the three-digit column of event numbers can hold.
+    /// The highest number for the three digits of the event number column.
     static constexpr std::size_t MostEventsInAFile = 999;
 
     /// Returns InvalidArgument for an empty list and for one without a readable event, FileAccessFailed when the file

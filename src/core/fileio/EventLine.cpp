@@ -10,7 +10,8 @@ namespace cadrel::core::fileio {
 
 namespace {
 
-/// Takes the next column off the front of `rest`; nothing when there is none. A column of mere tabs is there, but empty.
+/// Takes the next column off the front of `rest`; nothing when there is none. A column that has only tabs counts as an
+/// empty column.
 std::optional<std::string_view> takeColumn(std::string_view& rest)
 {
     rest.remove_prefix(std::min(rest.find_first_not_of(' '), rest.size()));

@@ -11,13 +11,13 @@
 
 namespace cadrel::core::fileio {
 
-/// The columns of an event line, which are separated by blanks. A duration stands in the line of a dissolve or wipe
-/// only, and the four timecodes follow on it:
+/// The columns of an event line, which are separated by blanks. Only a dissolve or wipe has a duration, before the four
+/// timecodes:
 ///
 ///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
 ///     002  A002C001 V     D    024 11:00:00:00 11:00:03:00 01:00:04:00 01:00:07:00
 struct EventLine {
-    /// Finds the columns of a trimmed line, of which the views are parts. Those behind the line's end stay empty.
+    /// Finds the columns of a trimmed line, of which the views are parts. Columns after the end of the line stay empty.
     explicit EventLine(std::string_view line);
 
     /// Whether no column is missing.
@@ -26,7 +26,7 @@ struct EventLine {
     std::string_view number;
     std::string_view rollName;
     std::string_view channel;
-    std::optional<TransitionType::Type> transitionType; ///< nothing for a letter that stands for none
+    std::optional<TransitionType::Type> transitionType; ///< nothing for an unknown letter
     std::optional<std::string_view> duration;
     std::array<std::string_view, 4> timecodes; ///< SRC IN, SRC OUT, DST IN, DST OUT
     std::size_t timecodeCount = 0;             ///< how many of them the line has

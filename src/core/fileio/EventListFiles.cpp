@@ -21,7 +21,7 @@ bool isNamedAsBRoll(const std::string& rollName)
     return rollName.ends_with('B');
 }
 
-/// Gives each B-roll the name of its roll, where the list has that roll.
+/// Gives each B-roll the name of its roll, if the list has that roll.
 void renameBRollsOf(const EventList& list)
 {
     const auto& events = list.events();

@@ -24,7 +24,7 @@ LineReader::LineReader(const std::filesystem::path& file) : m_buffer(ChunkSize, 
     std::error_code error;
     if (!std::filesystem::is_regular_file(file, error))
         throw Result::FileAccessFailed;
-    // The chunks are read straight into the own buffer.
+    // The chunks are read directly into this buffer.
     m_stream.rdbuf()->pubsetbuf(nullptr, 0);
     m_stream.open(file, std::ios::binary);
     if (!m_stream.is_open())

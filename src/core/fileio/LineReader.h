@@ -12,14 +12,15 @@
 namespace cadrel::core::fileio {
 
 /// Reads the lines of a file of 8-bit text one by one, holding no more of the file than a chunk or its longest line.
-/// All lines end with CR when a CR comes before the first LF, else with LF, so that of CR LF the LF opens the next line.
+/// All lines end with CR if a CR comes before the first LF, otherwise with LF. So after CR LF the LF is at the start of
+/// the next line.
 class LineReader {
 public:
     /// Throws Result::FileAccessFailed for what isn't a regular file or can't be read. Never waits for a pipe.
     explicit LineReader(const std::filesystem::path& file);
 
     /// The next line without blanks, tabs, LF and CR at its ends, valid until the next call; nothing at the end of the
-    /// file. Throws Result::FileAccessFailed when the reading breaks off.
+    /// file. Throws Result::FileAccessFailed when reading fails.
     std::optional<std::string_view> next();
 
 private:
@@ -29,8 +30,8 @@ private:
 
     std::ifstream m_stream;
     std::string m_buffer;
-    std::size_t m_begin = 0; ///< what has been read from the file and not given out stands from here
-    std::size_t m_end = 0;   ///< to here
+    std::size_t m_begin = 0; ///< what has been read and not yet returned starts here
+    std::size_t m_end = 0;   ///< and ends here
     char m_delimiter = '\n';
 };
 

@@ -24,7 +24,7 @@ public:
     virtual util::Result::Type parse(const std::wstring& path, EventList& events, Framerate& framerate,
                                      bool acceptAudio) = 0;
 
-    /// Without audio, and without an interest in the rate.
+    /// Without audio, and without returning the rate.
     util::Result::Type parse(const std::wstring& path, EventList& events)
     {
         Framerate scratch;

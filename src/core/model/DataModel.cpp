@@ -161,7 +161,7 @@ bool DataModel::isPlacedChange(const std::shared_ptr<EventBase>& event) const
 EventList DataModel::eventsOf(const EventList& programme, const Timecode& in, const Timecode& out)
 {
     const CutMap map(programme, Timecode::framerate());
-    // Shrunk, so that a neighbour that merely touches isn't hit.
+    // The range is made a little shorter, so that it doesn't include a neighbour that only touches it.
     const double start = in.toSeconds() + SameInstant;
     const double end = out.toSeconds() - SameInstant;
     if (start > end)

@@ -18,7 +18,7 @@
 
 namespace cadrel::core {
 
-/// The keys of the data model's property map. The model itself gives a meaning to PreviewActive alone.
+/// The keys of the data model's property map. The model itself uses only PreviewActive.
 struct PropertyKey {
     enum Type : std::int32_t {
         LastEdlFolder = 10003,          ///< string
@@ -30,7 +30,7 @@ struct PropertyKey {
         NewTableSortForward = 10009,    ///< bool
         ChangeTableSortColumn = 10010,  ///< integer
         ChangeTableSortForward = 10011, ///< bool
-        ProjectCycleLeft = 10012,       ///< double, as it stood when the preview went on
+        ProjectCycleLeft = 10012,       ///< double, as it was when the preview was switched on
         ProjectCycleRight = 10013,      ///< double, likewise
         TransportCycleLower = 10014,    ///< double, likewise
         TransportCycleUpper = 10015,    ///< double, likewise
@@ -64,14 +64,14 @@ public:
 
     /// Where changes go; null stops all forwarding. Not owned.
     void setNotifier(ChangeContextNotificationBase* notifier);
-    /// Listens to all five members, or to none. Send nothing.
+    /// Make the model listen to all five members, or to none. They send nothing.
     void startListening();
     void stopListening();
 
     void setProperty(std::int32_t key, const Variant& value);
     bool hasProperty(std::int32_t key) const;
     void removeProperty(std::int32_t key);
-    /// Returns InvalidArgument for an absent key and leaves `value` alone; never throws.
+    /// Returns InvalidArgument for an absent key and doesn't change `value`; never throws.
     util::Result::Type getProperty(std::int32_t key, Variant& value) const;
     bool isPreviewActive() const;
     /// Sends nothing.
@@ -79,31 +79,33 @@ public:
     /// Needs a notifier.
     void notifyPreviewState();
 
-    /// Generates the change EDL from the old and the new one by the settings and heals it. A failure empties the change
-    /// EDL and is the result; nothing is thrown for it. Sends one list change in any case.
+    /// Generates the change EDL from the old and the new one by the settings and heals it. A failure is returned, not
+    /// thrown, and leaves the change EDL empty. Sends one list change in any case.
     util::Result::Type generateChangeEdl();
     /// Marks the VFX shots of the old and the new EDL by the settings. Throws Result::InvalidArgument for an enabled
     /// row that doesn't compile, with no event touched.
     void applyVfxHandling();
     /// The events of the old EDL that a change event's source range covers, and those of the new EDL that its
-    /// destination range covers; empty for what isn't a member of the change EDL or has an empty range. Throw
+    /// destination range covers; empty for an event that isn't in the change EDL or has an empty range. Throw
     /// Result::InvalidArgument for a range shorter than the tolerance of a comparison.
     EventList oldEventsFor(const std::shared_ptr<EventBase>& changeEvent) const;
     EventList newEventsFor(const std::shared_ptr<EventBase>& changeEvent) const;
-    /// Looks at all events anew after a change of the project's frame rate; sends one DataModelChangeContext.
+    /// Works out the flaws of all events again after a change of the project's frame rate; sends one
+    /// DataModelChangeContext.
     void revalidateEvents();
     /// The state of a fresh model, except that listeners stay and the pattern rows keep their content.
     void reset();
-    /// Reads a snapshot without touching the settings and sends a DataModelChangeContext. A failure is thrown on; it
-    /// empties the rest of the model, unless the snapshot's version number already can't be read or is a newer one.
+    /// Reads a snapshot, but not the settings, and sends a DataModelChangeContext. A failure is thrown, and empties the
+    /// model except for the settings. Only when the snapshot's version number can't be read or is a newer one, the
+    /// model stays as it is.
     void restore(serialize::ByteArchive& archive);
 
     /// Forwards the context to the notifier.
     void onChange(const ChangeContext& context) override;
 
-    /// The readers empty the model on a failure and throw behind the one DataModelChangeContext that they send:
-    /// readCurrent what the members throw, readOlder Result::UnknownVersion, and both Result::NotAvailable for what is
-    /// none of the system's own values. During `restore` readCurrent sends nothing, nor does a failing readOlder.
+    /// On a failure the readers empty the model, send one DataModelChangeContext and then throw. readCurrent throws
+    /// what the members throw, and readOlder Result::UnknownVersion. Both throw Result::NotAvailable for an exception
+    /// that isn't a Result. During `restore` readCurrent sends nothing, and readOlder sends nothing when it fails.
     void readCurrent(serialize::ByteArchive& archive) override;
     void write(serialize::ByteArchive& archive) const override;
     void readOlder(serialize::ByteArchive& archive, std::uint32_t version) override;

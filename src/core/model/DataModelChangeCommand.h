@@ -8,7 +8,7 @@
 namespace cadrel::core {
 
 /// The scope of one change of the data model that the user can undo. A command takes a snapshot of the model when it is
-/// made and hands it over when it is destroyed.
+/// created, and passes it on when it is destroyed.
 class DataModelChangeCommand {
 public:
     explicit DataModelChangeCommand(std::wstring name) : m_name(std::move(name)) {}

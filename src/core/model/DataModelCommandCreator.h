@@ -13,7 +13,7 @@ namespace serialize {
 class ByteArchive;
 }
 
-/// An edit that the host adapter has open; the core doesn't look into it.
+/// An edit that the host adapter has open. The core only passes it on.
 class EditTransactionHandle;
 
 /// Makes the undo scopes; the host adapter implements it.
@@ -23,7 +23,7 @@ public:
 
     virtual std::unique_ptr<DataModelChangeCommand> createCommand(const std::wstring& name) = 0;
     virtual std::unique_ptr<DataModelChangeCommand> createCommand(EditTransactionHandle& transaction) = 0;
-    /// With a snapshot of the model that was taken before.
+    /// Uses a snapshot of the model that was taken earlier.
     virtual std::unique_ptr<DataModelChangeCommand> createCommand(EditTransactionHandle& transaction,
                                                                   const serialize::ByteArchive& snapshot) = 0;
 };
@@ -31,7 +31,7 @@ public:
 /// Installs the process-wide creator, or removes it with null. Not owned.
 void setDataModelCommandCreator(DataModelCommandCreator* creator);
 
-/// A scope from the process-wide creator; null when none is set, and the caller then goes on without undo.
+/// A scope from the process-wide creator; null when there is none; the caller then goes on without undo.
 std::unique_ptr<DataModelChangeCommand> createDataModelCommand(const std::wstring& name);
 std::unique_ptr<DataModelChangeCommand> createDataModelCommand(EditTransactionHandle& transaction);
 std::unique_ptr<DataModelChangeCommand> createDataModelCommand(EditTransactionHandle& transaction,

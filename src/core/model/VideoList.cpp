@@ -25,7 +25,7 @@ std::wstring fileNameOf(const std::string& path)
     return StringUtil::fileNameOf(StringUtil::toWide(path));
 }
 
-/// A stored path may be no text; it has no file name then and is found by the whole path alone.
+/// A stored path may not be valid text. It has no file name then, and is found only by the whole path.
 bool isSameFile(const std::string& stored, const std::string& path)
 {
     try {
@@ -147,7 +147,7 @@ void VideoList::setStart(const std::string& path, const Timecode& start)
         return;
     auto moved = m_entries.extract(found);
     moved.value().start = start;
-    // Whatever stands there would keep the moved entry out of the set.
+    // An entry that is already there would keep the moved entry out of the set.
     m_entries.erase(moved.value());
     m_entries.insert(std::move(moved));
     notifyListeners();

@@ -14,9 +14,9 @@
 
 namespace cadrel::core {
 
-/// The videos of the new edit version, each where it starts on the timeline, with at most one for any start. A file's
-/// name without its folder is its identity, which is found by way of the string converter. Every changing operation
-/// sends a plain ChangeContext of type VideoListChanged.
+/// The videos of the new edit version, by their starts on the timeline. No two start at the same time. A video is
+/// identified by its file's name without the folder, which the string converter finds. Every changing operation sends a
+/// plain ChangeContext of type VideoListChanged.
 class VideoList : public serialize::Serializable, public ChangeContextNotificationBase {
 public:
     class Entry : public serialize::Serializable {
@@ -61,7 +61,7 @@ public:
     util::Result::Type add(const Entry& entry, bool replaceAtStart);
     /// Refused when the file isn't listed.
     util::Result::Type remove(const std::string& path);
-    /// Does nothing and sends nothing when the file isn't listed. An entry that stands at the new start gives way.
+    /// Does nothing and sends nothing when the file isn't listed. An entry that is at the new start is removed.
     void setStart(const std::string& path, const Timecode& start);
     /// Notifies also when the list was empty.
     void clear();

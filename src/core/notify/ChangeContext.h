@@ -2,6 +2,8 @@
 
 #pragma once
 
+#include "util/Result.h"
+
 #include <cstdint>
 
 namespace cadrel::core {
@@ -52,12 +54,31 @@ public:
     EventChangeContext() : ChangeContext(EventChanged) {}
 };
 
-/// A deferred job of the host adapter has ended.
+/// A deferred job of the host adapter has ended, or will never begin.
 class ActionChangeContext : public ChangeContext {
 public:
-    explicit ActionChangeContext(std::int32_t finished) : ChangeContext(ActionFinished), action(finished) {}
+    enum Action : std::int32_t {
+        Preview = 0,
+        Run = 1, ///< applies the changes
+    };
 
-    std::int32_t action; ///< 0 the preview job, 1 the change-applying job
+    explicit ActionChangeContext(std::int32_t finished, util::Result::Type ended = util::Result::Ok)
+        : ChangeContext(ActionFinished), action(finished), result(ended)
+    {
+    }
+    /// Of a job that was requested and never begins: its project was left, or the preview has ended.
+    static ActionChangeContext dropped(std::int32_t requested)
+    {
+        ActionChangeContext context(requested, util::Result::Cancelled);
+        context.isDropped = true;
+        return context;
+    }
+
+    std::int32_t action; ///< an Action
+    /// Ok when all of it is done, and Cancelled when nothing is: the user has cancelled it, and it was taken back. Else why
+    /// it broke off; what was done until then stays, and can be undone.
+    util::Result::Type result;
+    bool isDropped = false;
 };
 
 } // namespace cadrel::core

@@ -6,7 +6,7 @@ namespace cadrel::core {
 
 class ChangeContext;
 
-/// Whoever wants to hear of changes. A listener removes itself from its notifiers before it dies.
+/// Is told of changes. A listener removes itself from its notifiers before it dies.
 class ChangeContextListenerInterface {
 public:
     virtual ~ChangeContextListenerInterface() = default;

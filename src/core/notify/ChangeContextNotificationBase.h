@@ -18,20 +18,21 @@ public:
     ChangeContextNotificationBase& operator=(const ChangeContextNotificationBase&) { return *this; }
     virtual ~ChangeContextNotificationBase() = default;
 
-    /// Adding twice has the effect of once. Not owned.
+    /// Adding a listener twice is the same as once. Listeners are not owned.
     virtual void addListener(ChangeContextListenerInterface* listener);
     /// Removing a listener that isn't there does nothing.
     virtual void removeListener(ChangeContextListenerInterface* listener);
-    /// Calls every listener at once, in an order without meaning. What a listener throws passes through, and the
-    /// remaining listeners don't hear of the change.
+    /// Calls every listener at once, in no particular order. If a listener throws, the exception passes through and the
+    /// remaining listeners are not called.
     virtual void notify(const ChangeContext& context);
 
 private:
-    /// The listener with the next greater address, whoever has been added or removed since; null behind the last.
+    /// The listener with the next greater address, also if listeners have been added or removed since; null after the
+    /// last.
     ChangeContextListenerInterface* listenerBehind(const ChangeContextListenerInterface* listener) const;
 
-    // A set in the order of the addresses. Of a million events most have the one list as their listener, which takes no
-    // further memory.
+    // A set in the order of the addresses. Most events have one listener, their list, so the first takes no further
+    // memory.
     ChangeContextListenerInterface* m_first = nullptr; ///< null when there is none at all
     std::vector<ChangeContextListenerInterface*> m_others;
 };

@@ -8,8 +8,8 @@ namespace cadrel::core::serialize {
 
 class ByteArchive;
 
-/// An object that knows its persisted form, framed by the version number of its class, so that each object of a stream
-/// can be read by code that is newer than its writer.
+/// An object that can be written to a stream and read again. Its version number comes first, so that newer code can
+/// read what older code wrote.
 class Serializable {
 public:
     virtual ~Serializable() = default;

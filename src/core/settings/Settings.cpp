@@ -24,7 +24,7 @@ std::int32_t readMatchBy(ByteArchive& archive)
 
 std::int32_t readHealMode(ByteArchive& archive)
 {
-    // A mode behind the last that is offered now passes, too.
+    // A mode after the last one that is offered now is accepted too.
     constexpr std::int32_t LastAccepted = 4;
     std::int32_t value = 0;
     archive >> value;
@@ -129,7 +129,7 @@ void Settings::setPreserveMaterial(double before, double after)
         m_preserveMaterialBefore = before;
         m_preserveMaterialAfter = after;
     }
-    // Also for refused values, so that a dialog which shows them falls back to the stored ones.
+    // Notifies also for refused values, so that a dialog that shows them goes back to the stored ones.
     notifyListeners();
 }
 
@@ -223,8 +223,8 @@ void Settings::readOptions(ByteArchive& archive, std::uint32_t version)
     readVfxPatterns(archive);
     readSnippetOptions(archive);
 
-    // What an older version doesn't hold gets the value that its projects were processed with: virgin territories were
-    // always created then.
+    // An option that an older version doesn't have gets the value with which its projects were processed: virgin
+    // territories were always created then.
     m_bRollRenaming = true;
     m_remainsThreshold = 5;
     m_createVirginTerritories = true;
@@ -244,7 +244,7 @@ void Settings::readFirstVersion(ByteArchive& archive)
     m_matchBy = readMatchBy(archive);
     m_healMode = readHealMode(archive);
     archive >> m_createDestinationMarkers >> m_createDissolveWipeMarkers >> m_createInsertMarkers;
-    // Neither a count nor frames: the stream has as many rows as the object.
+    // The stream has neither a count nor frames: it has as many rows as the object.
     for (VfxPatternEntry& row : m_vfxPatterns)
         row.readCurrent(archive);
     readSnippetOptions(archive);

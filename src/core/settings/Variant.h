@@ -27,7 +27,7 @@ public:
 
     /// The conversions don't look at the type: a string gives 0 as a number, a number an empty text.
     bool toBool() const;
-    /// Truncates; a number beyond 32 bits gives the nearest that fits, and one that is none gives 0.
+    /// Truncates; a number beyond 32 bits gives the nearest that fits, and NaN gives 0.
     std::int32_t toInt() const;
     float toFloat() const;
     double toDouble() const;

@@ -12,8 +12,8 @@
 namespace cadrel::core {
 
 /// The compiled VFX patterns. A name that is a row's prefix, a version number and its postfix loses the number, so that
-/// all versions of a VFX shot bear one name. In a row "." stands for itself and "*" for exactly one character that ends
-/// no line.
+/// all versions of a VFX shot have the same name. In a row "." stands for itself and "*" for exactly one character, but
+/// not for the end of a line.
 class VfxNameMatcher {
 public:
     /// The characters that a prefix or postfix may hold.
@@ -26,8 +26,8 @@ public:
     /// Replaces the patterns by the enabled rows that are not empty; throws as above.
     void compileEnabled(const std::vector<VfxPatternEntry>& entries);
 
-    /// The name without its version digits. They are looked for at the length of the compiled prefix, in which each
-    /// "." counts two places; deliberately so.
+    /// The name without its version digits. The digits are looked for at the length of the compiled prefix, in which
+    /// each "." counts as two places. This is deliberate.
     std::string stripVersion(const std::string& name) const;
     bool hasVersion(const std::string& name) const;
 

@@ -6,7 +6,7 @@
 
 namespace cadrel::core {
 
-/// Whoever knows the project's frame rate; see Timecode::setFramerateProvider.
+/// Knows the project's frame rate; see Timecode::setFramerateProvider.
 class FramerateProvider {
 public:
     virtual Framerate getFramerate() const = 0;

@@ -146,7 +146,7 @@ bool Timecode::isValidSeconds(double seconds)
 {
     const Framerate current = framerate();
     const double rounded = std::floor(current.rate * seconds + 0.5);
-    // A number that is none fails both comparisons.
+    // NaN fails both comparisons.
     return rounded >= 0.0 && rounded <= static_cast<double>(current.lastFrame);
 }
 

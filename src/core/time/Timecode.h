@@ -15,8 +15,8 @@ namespace cadrel::core {
 
 class FramerateProvider;
 
-/// A SMPTE-style timecode in a 24-hour day: the four written fields and no frame rate. The same value means another
-/// instant under another rate, and each operation takes the rate as an argument or from the one process-wide
+/// A SMPTE-style timecode in a 24-hour day: the four written fields but no frame rate. The same value means a different
+/// instant at a different rate, so each operation takes the rate as an argument or from the one process-wide
 /// FramerateProvider. Every operation without a Framerate argument throws Result::NotAvailable when no provider is
 /// installed, except where it says otherwise. A setter that throws leaves the value as it was.
 class Timecode : public serialize::Serializable {
@@ -39,12 +39,12 @@ public:
     Timecode& operator=(const Timecode& other);
     ~Timecode() override = default;
 
-    /// The value that the constructor from text gives, or nothing where it throws.
+    /// The value that the constructor from text gives; nothing where that throws.
     static std::optional<Timecode> parse(std::string_view text);
 
     /// Installs the source of the project's rate, or removes it with null. Not owned.
     static void setFramerateProvider(const FramerateProvider* provider);
-    /// The one that is installed; null when there is none.
+    /// The installed source; null when there is none.
     static const FramerateProvider* framerateProvider();
     /// The provider's current rate.
     static Framerate framerate();

@@ -9,8 +9,8 @@
 
 namespace cadrel::gui {
 
-/// What an abstract service of the process is reached by: at most one object, which whoever stands at the border to the
-/// outside installs and takes away. `Service` derives from ProcessService<Service>.
+/// Access to an abstract service of the process. There is at most one object, which the host's side installs and
+/// removes. `Service` derives from ProcessService<Service>.
 template <class Service>
 class ProcessService {
 public:
@@ -24,7 +24,7 @@ public:
             throw util::Result::NotAvailable;
         return *s_instance;
     }
-    /// Throws Result::NotAvailable when there is one already, which stays.
+    /// Throws Result::NotAvailable when there is one already; the old one stays.
     static void install(std::unique_ptr<Service> service)
     {
         if (s_instance)

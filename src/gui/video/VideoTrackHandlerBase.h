@@ -14,7 +14,7 @@ class VideoTrackHandlerBase {
 public:
     /// What a channel's track carries.
     struct Mode {
-        static constexpr std::int32_t None = -1;  ///< there is no track
+        static constexpr std::int32_t None = -1;  ///< there is no track, or nobody has said what it carries
         static constexpr std::int32_t Old = 0;    ///< the old picture
         static constexpr std::int32_t New = 1;    ///< the new picture
         static constexpr std::int32_t OldOff = 2; ///< stands for the old picture, but the user has put another there
@@ -25,7 +25,7 @@ public:
     public:
         virtual ~Listener() = default;
 
-        /// The tracks, or what they carry, aren't what they were.
+        /// The tracks, or what they carry, have changed.
         virtual void tracksChanged() = 0;
     };
 

@@ -22,7 +22,6 @@ ImageProviderThread::ImageProviderThread(IHostContext* context)
     if (m_objectFactory)
         m_factoryObject = m_objectFactory->createObject(IObjectFactory::ThumbnailClass, IObjectFactory::ThumbnailType);
     m_factory = query<IThumbnailFactory>(m_factoryObject);
-    startThread();
 }
 
 ImageProviderThread::~ImageProviderThread()
@@ -44,6 +43,10 @@ bool ImageProviderThread::request(juce::Point<int> size, VideoFrame frame)
 {
     if (m_state != State::Free)
         return false;
+    if (!isThreadRunning() && !startThread()) {
+        m_hasNoThread = true;
+        return false;
+    }
     m_requestSize = size;
     m_requestFrame = std::move(frame);
     m_state = State::Requested;

@@ -19,7 +19,7 @@ class IHostContext;
 
 namespace cadrel::host {
 
-/// Lets the host draw pictures on a thread of its own, one at a time. A request goes round between the two threads, and who
+/// Lets the host draw pictures on a thread of its own, one at a time; the first request starts it. A request goes round between the two threads, and who
 /// has it alone may touch what belongs to it:
 ///
 ///          request            render             fetch
@@ -27,7 +27,7 @@ namespace cadrel::host {
 ///         main thread         this thread      main thread
 class ImageProviderThread : public juce::Thread {
 public:
-    /// Starts. Without the host's thumbnail factory, too, though there will be no pictures then.
+    /// Without the host's thumbnail factory there will be no pictures.
     explicit ImageProviderThread(Velmark::IHostContext* context);
     /// It has to be stopped.
     ~ImageProviderThread() override;
@@ -39,8 +39,9 @@ public:
     // For the main thread.
 
     /// Whether pictures can be had at all.
-    bool canDraw() const { return m_factory && isThreadRunning(); }
-    /// Asks for a picture of about that size. False when the picture before it hasn't been fetched yet.
+    bool canDraw() const { return m_factory && !m_hasNoThread; }
+    /// Asks for a picture of about that size. False when the picture before it hasn't been fetched yet, and when the system
+    /// gives no thread, after which there are no pictures any more.
     bool request(juce::Point<int> size, VideoFrame frame);
     /// Whether a picture has come that was asked for. Without `success` there is none of that frame, and `image` stays.
     bool fetch(juce::Image& image, bool& success);
@@ -61,6 +62,7 @@ private:
     int m_width = 0;
     int m_height = 0;
     bool m_success = false;
+    bool m_hasNoThread = false; ///< it couldn't be started
     juce::WaitableEvent m_wake;
     std::atomic<State> m_state = State::Free;
 };

@@ -3,8 +3,6 @@
 #include "host/project/MemoSync.h"
 
 #include "core/edl/EventBase.h"
-#include "core/edl/EventList.h"
-#include "host/project/Project.h"
 #include "host/track/Instant.h"
 #include "host/track/Marker.h"
 #include "host/track/Track.h"
@@ -77,10 +75,11 @@ double MemoSync::Stretch::toSource(double previewTime) const
 //     event i + 1                         |=============|      written later
 //     stretch of i      preview  |========|
 //                       source   |========|--------|
-std::vector<MemoSync::Stretch> MemoSync::stretchesOf(const Project& project, const Events& events, std::size_t index)
+std::vector<MemoSync::Stretch> MemoSync::stretchesOf(const Previewed& previewed, std::size_t index)
 {
-    const core::Framerate framerate = project.getFramerate();
-    const double offset = project.previewOffset();
+    const Events& events = previewed.events;
+    const core::Framerate framerate = previewed.framerate;
+    const double offset = previewed.offset;
     const auto isWritten = [](const core::EventBase& event) {
         return !event.hasFlaw(core::EventFlaw::TimecodeInvalid) && event.srcIn() < event.srcOut() &&
                event.dstIn() < event.dstOut();
@@ -111,9 +110,9 @@ std::vector<MemoSync::Stretch> MemoSync::stretchesOf(const Project& project, con
     return stretches;
 }
 
-std::vector<HostEvent> MemoSync::memosIn(const Track& memos, const SecondsRange& range) const
+std::vector<HostEvent> MemoSync::memosIn(const Track& memos, const SecondsRange& range)
 {
-    const double origin = m_project.timeOrigin();
+    const double origin = memos.timeOrigin();
     std::vector<HostEvent> found = memos.eventsInRange(range.start - origin, range.end - origin);
     // A range doesn't hold its end, and what is copied doesn't either.
     std::erase_if(found, [&range](const HostEvent& memo) { return !isBefore(memo.getStart(), range.end); });
@@ -131,19 +130,17 @@ const MemoSync::Memo* MemoSync::findById(const Memos& memos, std::int64_t id)
     return found != memos.end() ? &*found : nullptr;
 }
 
-MemoSync::Preview MemoSync::previewOf(const Track& memos) const
+MemoSync::Preview MemoSync::previewOf(const Track& memos, const Previewed& previewed)
 {
     Preview preview;
-    const Events& events = m_project.previewEvents().events();
-    for (std::size_t index = 0; index < events.size(); ++index) {
-        for (const Stretch& stretch : stretchesOf(m_project, events, index))
-            preview.shown.push_back({events[index], stretch, {}});
+    for (std::size_t index = 0; index < previewed.events.size(); ++index) {
+        for (const Stretch& stretch : stretchesOf(previewed, index))
+            preview.shown.push_back({previewed.events[index], stretch, {}});
     }
 
     preview.adrift = memos.clipEvents();
-    std::erase_if(preview.adrift, [offset = m_project.previewOffset()](const HostEvent& memo) {
-        return isBefore(memo.getEnd(), offset);
-    });
+    std::erase_if(preview.adrift,
+                  [offset = previewed.offset](const HostEvent& memo) { return isBefore(memo.getEnd(), offset); });
     const auto give = [&preview](Shown& shown, const auto& belongs) {
         std::erase_if(preview.adrift, [&](const HostEvent& memo) {
             if (!belongs(memo))
@@ -161,16 +158,16 @@ MemoSync::Preview MemoSync::previewOf(const Track& memos) const
     return preview;
 }
 
-void MemoSync::remember(const Track& memos)
+void MemoSync::remember(const Track& memos, const Previewed& previewed)
 {
     m_remembered.clear();
-    for (const Shown& shown : previewOf(memos).shown)
+    for (const Shown& shown : previewOf(memos, previewed).shown)
         std::ranges::transform(shown.copies, std::back_inserter(m_remembered[shown.event]), memoOf);
 }
 
-void MemoSync::follow(const Track& memos, IEditTransaction& transaction)
+void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTransaction& transaction)
 {
-    const Preview preview = previewOf(memos);
+    const Preview preview = previewOf(memos, previewed);
     for (const Shown& shown : preview.shown) {
         const auto remembered = m_remembered.find(shown.event);
         followStretch(memos, transaction, shown, preview.adrift,
@@ -210,13 +207,13 @@ void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, 
                    copy.getName(),
                    {},
                    copy.getUserId()}
-                .insertInto(m_project.hostContext(), transaction, memos);
+                .insertInto(m_hostContext, transaction, memos);
         }
     }
 }
 
 std::vector<HostEvent> MemoSync::sourcesOf(const Track& memos, const Stretch& stretch,
-                                           const std::vector<HostEvent>& copies) const
+                                           const std::vector<HostEvent>& copies)
 {
     std::vector<HostEvent> found = memosIn(memos, stretch.source);
     // A memo that only reaches into the stretch has its copy there, too.

@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "core/time/Framerate.h"
 #include "core/time/SecondsRange.h"
 #include "host/track/HostEvent.h"
 
@@ -13,6 +14,7 @@
 
 namespace Velmark {
 class IEditTransaction;
+class IHostContext;
 } // namespace Velmark
 
 namespace cadrel::core {
@@ -21,7 +23,6 @@ class EventBase;
 
 namespace cadrel::host {
 
-class Project;
 class Track;
 
 /// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
@@ -30,13 +31,22 @@ class Track;
 /// as it was.
 class MemoSync {
 public:
-    explicit MemoSync(Project& project) : m_project(project) {}
+    using Events = std::vector<std::shared_ptr<core::EventBase>>;
+    /// What is shown in the preview stretch.
+    struct Previewed {
+        const Events& events;
+        core::Framerate framerate; ///< of their timecodes
+        double offset;             ///< how much later than its destination each one stands, in seconds
+    };
 
-    /// Carries over what has become of the copies since they were remembered or, where they weren't, whatever differs. Needs
-    /// the preview offset. Throws Result::HostObjectMissing and Result::HostCallFailed.
-    void follow(const Track& memos, Velmark::IEditTransaction& transaction);
+    /// The context outlives this object.
+    explicit MemoSync(Velmark::IHostContext* context) : m_hostContext(context) {}
+
+    /// Carries over what has become of the copies since they were remembered or, where they weren't, whatever differs.
+    /// Throws Result::HostObjectMissing and Result::HostCallFailed.
+    void follow(const Track& memos, const Previewed& previewed, Velmark::IEditTransaction& transaction);
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.
-    void remember(const Track& memos);
+    void remember(const Track& memos, const Previewed& previewed);
     void forget() { m_remembered.clear(); }
 
 private:
@@ -58,7 +68,6 @@ private:
         bool operator==(const Memo&) const = default;
     };
     using Memos = std::vector<Memo>;
-    using Events = std::vector<std::shared_ptr<core::EventBase>>;
     /// A stretch with the copies that belong to it.
     struct Shown {
         std::shared_ptr<core::EventBase> event;
@@ -72,9 +81,9 @@ private:
         std::vector<HostEvent> adrift; ///< in no stretch
     };
 
-    static std::vector<Stretch> stretchesOf(const Project& project, const Events& events, std::size_t index);
-    Preview previewOf(const Track& memos) const;
-    std::vector<HostEvent> memosIn(const Track& memos, const core::SecondsRange& range) const;
+    static std::vector<Stretch> stretchesOf(const Previewed& previewed, std::size_t index);
+    static Preview previewOf(const Track& memos, const Previewed& previewed);
+    static std::vector<HostEvent> memosIn(const Track& memos, const core::SecondsRange& range);
     static Memo memoOf(const HostEvent& event);
     /// Null when there is none.
     static const Memo* findById(const Memos& memos, std::int64_t id);
@@ -82,15 +91,15 @@ private:
     void followStretch(const Track& memos, Velmark::IEditTransaction& transaction, const Shown& shown,
                        const std::vector<HostEvent>& adrift, const Memos* remembered);
     /// The memos that a stretch shows.
-    std::vector<HostEvent> sourcesOf(const Track& memos, const Stretch& stretch,
-                                     const std::vector<HostEvent>& copies) const;
+    static std::vector<HostEvent> sourcesOf(const Track& memos, const Stretch& stretch,
+                                            const std::vector<HostEvent>& copies);
     /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
     static void keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered);
     /// What the copy was like is null where that isn't known.
     static void carryOver(Velmark::IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo,
                           const Stretch& stretch, const Memo* remembered);
 
-    Project& m_project;
+    Velmark::IHostContext* m_hostContext;
     std::map<std::shared_ptr<core::EventBase>, Memos> m_remembered;
 };
 

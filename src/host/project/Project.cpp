@@ -46,9 +46,9 @@ bool areSame(const core::Framerate& a, const core::Framerate& b)
 
 } // namespace
 
-Project::Project(IHostContext* context, IProjectDocument* document, VideoProvider* videoProvider)
-    : m_document(required(document)), m_mediaPool(context, document->getMediaPool()), m_videoProvider(videoProvider),
-      m_hostContext(context)
+Project::Project(IHostContext* context, IProjectDocument* document)
+    : m_document(required(document)), m_mediaPool(context, document->getMediaPool()), m_hostContext(context),
+      m_memoSync(context)
 {
 }
 
@@ -250,6 +250,11 @@ void Project::onProjectEdited(IEditTransaction& transaction)
     failure.raise();
 }
 
+MemoSync::Previewed Project::previewed() const
+{
+    return {m_previewEvents.events(), getFramerate(), requiredOffset()};
+}
+
 void Project::syncMemos(IEditTransaction& transaction)
 {
     Track& memos = markerTrack(TrackRole::Memos);
@@ -257,14 +262,14 @@ void Project::syncMemos(IEditTransaction& transaction)
     if (!memos.hasChanged())
         return;
     memos.assignIds(0.0, requiredOffset() - timeOrigin());
-    m_memoSync.follow(memos, transaction);
+    m_memoSync.follow(memos, previewed(), transaction);
 }
 
 void Project::rememberMemos()
 {
     const Track& memos = markerTrack(TrackRole::Memos);
     if (isPreviewing() && memos.isAlive())
-        m_memoSync.remember(memos);
+        m_memoSync.remember(memos, previewed());
     else
         m_memoSync.forget();
 }

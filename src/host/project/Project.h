@@ -13,6 +13,7 @@
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
 #include "host/track/TrackIndexes.h"
+#include "host/track/TrackProject.h"
 #include "host/track/TrackRole.h"
 #include "util/ListenerSet.h"
 #include "velmark/Counted.h"
@@ -44,7 +45,6 @@ class ProgressHandlerBase;
 namespace cadrel::host {
 
 class FirstFailure;
-class VideoProvider;
 
 /// One project of the host: it owns the model that belongs to it, finds and makes the tracks on which the system writes, and
 /// does to the host's tracks what the engine decides.
@@ -58,19 +58,19 @@ class VideoProvider;
 ///
 /// Failures are thrown as Result::Type: HostObjectMissing, HostCallFailed, and NotAvailable where an operation needs the
 /// preview offset or a live track and has none.
-class Project final : public core::FramerateProvider {
+class Project final : public core::FramerateProvider, public TrackProject {
 public:
     /// The preview offset of a project that has none.
     static constexpr double NoPreviewOffset = std::numeric_limits<double>::lowest();
 
-    /// None of them is owned. The document outlives the project; the provider may be null.
-    Project(Velmark::IHostContext* context, Velmark::IProjectDocument* document, VideoProvider* videoProvider);
+    /// Neither is owned. The document outlives the project.
+    Project(Velmark::IHostContext* context, Velmark::IProjectDocument* document);
     Project(const Project&) = delete;
     Project& operator=(const Project&) = delete;
     ~Project();
 
     Velmark::IProjectDocument* document() const { return m_document; }
-    Velmark::IHostContext* hostContext() const { return m_hostContext; }
+    Velmark::IHostContext* hostContext() const override { return m_hostContext; }
     core::DataModel& model() { return m_model; }
     MediaPool& mediaPool() { return m_mediaPool; }
 
@@ -99,13 +99,12 @@ public:
     /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
     /// alone, in which nobody else edits.
     void setUseTrackCache(bool flag);
-    bool isTrackAlive(const Velmark::ITrackNode* track);
-    /// The context of an object's times; null gives the root's.
-    Velmark::Counted<Velmark::FUnknown> containerOf(Velmark::FUnknown* object);
+    bool isTrackAlive(const Velmark::ITrackNode* track) override;
+    Velmark::Counted<Velmark::FUnknown> containerOf(Velmark::FUnknown* object) override;
 
     // Times.
 
-    double timeOrigin() const;
+    double timeOrigin() const override;
     double projectEnd() const;
     bool hasPreviewOffset() const;
     /// NoPreviewOffset when there is none.
@@ -124,10 +123,10 @@ public:
     /// Finds or makes the folder and the tracks of the markers that are switched on, and gives every memo a user id
     /// of its own.
     void createMarkerTracks(Velmark::IEditTransaction& transaction);
-    /// Finds or makes the track of the new picture; does nothing without new videos.
+    /// Finds or makes the track of the new picture, which its role alone tells; does nothing without new videos.
     void createVideoTracks(Velmark::IEditTransaction& transaction);
     /// Locks or unlocks what collectLockTracks has found, the track of the new picture and the marker tracks but the
-    /// memos'. Carries out all, and throws the first failure at the end.
+    /// memos'. What the user has locked himself stays as it is. Carries out all, and throws the first failure at the end.
     void setTracksLocked(bool lock);
     /// The tracks that a run would change and that the user hasn't locked.
     void collectLockTracks();
@@ -145,7 +144,7 @@ public:
     /// Brings the preview stretch back over the real programme. A restricted run clears the preview too, also where its
     /// range is empty and nothing is brought back.
     void completeApply(Velmark::IEditTransaction& transaction);
-    /// Writes each on the track of its kind, and none whose track isn't there. Throws Result::InvalidArgument for an entry
+    /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws Result::InvalidArgument for an entry
     /// whose kind is none of MarkerKind; earlier ones stay written.
     void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
     /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what
@@ -171,9 +170,8 @@ public:
     void onProjectChanged();
     /// The same: lets the memos follow their copies in the preview, and tells all listeners.
     void onProjectEdited(Velmark::IEditTransaction& transaction);
-    /// Not owned.
-    void addListener(ProjectListener* listener) { m_listeners.add(listener); }
-    void removeListener(ProjectListener* listener) { m_listeners.remove(listener); }
+    void addListener(ProjectListener* listener) override { m_listeners.add(listener); }
+    void removeListener(ProjectListener* listener) override { m_listeners.remove(listener); }
 
 private:
     void readModel();
@@ -191,13 +189,17 @@ private:
     Velmark::IParameter& locator(const char* name) const;
     void tellListeners(FirstFailure& failure);
     bool isPreviewing() const;
+    MemoSync::Previewed previewed() const;
     void syncMemos(Velmark::IEditTransaction& transaction);
     void rememberMemos();
 
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
     bool isMarkerTrack(const Track& track) const;
+    /// By its role; an empty handle without one.
     Track newVideoTrack();
+    /// Whether markers can be written there. On a track that the user has locked they would stay in the preview stretch.
+    static bool takesMarkers(const Track& track) { return track.isAlive() && !track.hostLocked(); }
     /// Puts a track of that role into the slot unless the one there is alive. False when there is none.
     bool findTrack(Track& slot, const char* word, std::int32_t role);
     void findOrCreateTrack(Velmark::IEditTransaction& transaction, Track& slot, const char* word, std::int32_t role);
@@ -206,7 +208,6 @@ private:
     /// Inserts a new track and makes it known by its role.
     void insertTrack(Velmark::IEditTransaction& transaction, Velmark::FUnknown* parent, Track& track,
                      std::int32_t role);
-    bool isMarkerRoleOn(std::int32_t role) const;
 
     // Edits.
     /// Selected, where the settings ask for selected tracks alone.
@@ -221,7 +222,6 @@ private:
     util::ListenerSet<ProjectListener> m_listeners; ///< before all tracks, which are among them
     Velmark::IProjectDocument* m_document;
     MediaPool m_mediaPool;
-    VideoProvider* m_videoProvider;
     std::array<Track, TrackRole::LastMarker> m_markerTracks; ///< by role, less one
     Track m_folderTrack;
     /// Nothing while it isn't in use, and until it's filled.
@@ -234,7 +234,7 @@ private:
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;
     TrackIndexes m_indexes; ///< cleared by each edit
-    MemoSync m_memoSync{*this};
+    MemoSync m_memoSync;
 };
 
 } // namespace cadrel::host

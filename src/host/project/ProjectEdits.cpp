@@ -2,6 +2,7 @@
 
 #include "core/cut/Cut.h"
 #include "core/cut/CutList.h"
+#include "core/cut/MarkerTrack.h"
 #include "core/cut/ProgressHandlerBase.h"
 #include "core/edl/EventBase.h"
 #include "core/settings/MatchBy.h"
@@ -25,7 +26,6 @@
 
 using namespace Velmark;
 using cadrel::core::ApplyTo;
-using cadrel::core::MarkerKind;
 using cadrel::core::SecondsRange;
 using cadrel::util::Result;
 using cadrel::util::StringUtil;
@@ -126,24 +126,6 @@ std::string hostText(std::string text)
     return text;
 }
 
-std::int32_t roleOf(std::int32_t markerKind)
-{
-    switch (markerKind) {
-    case MarkerKind::Insert:
-        return TrackRole::Insert;
-    case MarkerKind::DissolveWipe:
-        return TrackRole::DissolveWipe;
-    case MarkerKind::AutomationWarning:
-        return TrackRole::AutomationWarning;
-    case MarkerKind::AudioSnippet:
-        return TrackRole::AudioSnippet;
-    case MarkerKind::Overlap:
-        return TrackRole::Overlap;
-    default:
-        throw Result::InvalidArgument;
-    }
-}
-
 /// The blank behind a reel is deliberate.
 std::wstring destinationName(const core::EventBase& event, const core::Settings& settings)
 {
@@ -187,7 +169,8 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
             copyRange(group.tracks, group.source.start, group.source.end, group.destination + offset);
     }
     tick(cut.cutEvents().size());
-    if (m_model.settings().createDestinationMarkers())
+    const Track& destinations = markerTrack(TrackRole::Destination);
+    if (m_model.settings().createDestinationMarkers() && !(destinations.isAlive() && destinations.hostLocked()))
         writeDestinationMarker(transaction, event);
 }
 
@@ -206,8 +189,8 @@ void Project::generateMarkers(IEditTransaction& transaction, const std::vector<c
     const double offset = requiredOffset();
     m_indexes.clear();
     for (const core::MarkerEntry& entry : entries) {
-        const Track& track = markerTrack(roleOf(entry.kind));
-        if (!track.isAlive())
+        const Track& track = markerTrack(core::MarkerTrack::ofKind(entry.kind).role);
+        if (!takesMarkers(track))
             continue;
         Marker{entry.start + offset, entry.end + offset, StringUtil::toWide(hostText(entry.name)), {}}.insertInto(
             m_hostContext, transaction, track);

@@ -1,14 +1,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/settings/Settings.h"
+#include "core/cut/MarkerTrack.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
-#include "host/picture/VideoProvider.h"
 #include "host/project/Project.h"
 #include "velmark/Editing.h"
 
 #include <algorithm>
-#include <array>
 
 using namespace Velmark;
 
@@ -19,19 +17,14 @@ namespace {
 /// Beside the role a stored value has bits that say more.
 constexpr std::int32_t RoleBits = 0xff;
 
-/// The marker tracks from top to bottom.
-constexpr std::array MarkerTrackOrder{
-    TrackRole::Destination,  TrackRole::Insert,  TrackRole::DissolveWipe, TrackRole::AutomationWarning,
-    TrackRole::AudioSnippet, TrackRole::Overlap, TrackRole::Memos};
-
 } // namespace
 
 void Project::createMarkerTracks(IEditTransaction& transaction)
 {
     findOrCreateTrack(transaction, m_folderTrack, TypeWord::Folder, TrackRole::Markers);
-    for (const std::int32_t role : MarkerTrackOrder) {
-        if (isMarkerRoleOn(role))
-            findOrCreateMarkerTrack(transaction, role);
+    for (const core::MarkerTrack& track : core::MarkerTracks) {
+        if (track.isOn(m_model.settings()))
+            findOrCreateMarkerTrack(transaction, track.role);
     }
     // By these the copies in a preview are known again. What is copied keeps its id, so several memos may have the same.
     if (hasPreviewOffset())
@@ -42,14 +35,14 @@ void Project::createVideoTracks(IEditTransaction& transaction)
 {
     if (m_model.videoList().isEmpty())
         return;
-    Track video = newVideoTrack();
+    Track video;
     findOrCreateTrack(transaction, video, TypeWord::Video, TrackRole::NewVideo);
 }
 
 void Project::setTracksLocked(bool lock)
 {
     const auto setLock = [lock](Track& track) {
-        if (track.isAlive())
+        if (track.isAlive() && (track.hasLockState() || (lock && !track.hostLocked())))
             track.setLock(lock);
     };
     FirstFailure failure;
@@ -65,7 +58,6 @@ void Project::setTracksLocked(bool lock)
     }
     failure.ofStep([&] {
         Track video = newVideoTrack();
-        findTrack(video, TypeWord::Video, TrackRole::NewVideo);
         setLock(video);
     });
     failure.raise();
@@ -97,28 +89,9 @@ bool Project::isMarkerTrack(const Track& track) const
 
 Track Project::newVideoTrack()
 {
-    return m_videoProvider ? m_videoProvider->getTrackHandler().trackFor(VideoTrackHandler::Mode::New, true) : Track();
-}
-
-bool Project::isMarkerRoleOn(std::int32_t role) const
-{
-    const core::Settings& settings = m_model.settings();
-    switch (role) {
-    case TrackRole::Destination:
-        return settings.createDestinationMarkers();
-    case TrackRole::DissolveWipe:
-        return settings.createDissolveWipeMarkers();
-    case TrackRole::Insert:
-        return settings.createInsertMarkers();
-    case TrackRole::AutomationWarning:
-        return settings.createAutomationWarningMarkers();
-    case TrackRole::AudioSnippet:
-        return settings.createAudioSnippetMarkers();
-    case TrackRole::Overlap:
-        return settings.createOverlapMarkers();
-    default:
-        return true;
-    }
+    Track video;
+    findTrack(video, TypeWord::Video, TrackRole::NewVideo);
+    return video;
 }
 
 bool Project::findTrack(Track& slot, const char* word, std::int32_t role)

@@ -19,7 +19,8 @@ public:
 
     const Track& track() const { return m_track; }
 
-    /// Throws Result::HostObjectMissing when the track has gone, Result::InvalidArgument where its events stand in no
+    /// Answers what lies across an instant of the project's clock, and before and after it; it changes nothing. Throws
+    /// Result::HostObjectMissing when the track has gone, Result::InvalidArgument where its events stand in no
     /// order.
     core::CutEventSpans update(double time) override;
     std::wstring getTrackName() override;

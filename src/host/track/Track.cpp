@@ -4,10 +4,10 @@
 
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
-#include "host/project/Project.h"
 #include "host/track/AutomationCurve.h"
 #include "host/track/Instant.h"
 #include "host/track/TrackIndex.h"
+#include "host/track/TrackProject.h"
 #include "util/HostString.h"
 #include "velmark/Attributes.h"
 #include "velmark/Editing.h"
@@ -92,7 +92,7 @@ std::int64_t idAfter(std::int64_t id)
 
 } // namespace
 
-Track::Track(Project* project, ITrackNode* track) : m_project(project), m_track(Counted<ITrackNode>::share(track))
+Track::Track(TrackProject* project, ITrackNode* track) : m_project(project), m_track(Counted<ITrackNode>::share(track))
 {
     if (m_project)
         m_project->addListener(this);

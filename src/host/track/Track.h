@@ -22,6 +22,7 @@ namespace cadrel::host {
 
 class AutomationCurve;
 class TrackIndex;
+class TrackProject;
 
 /// A handle on one track of the host, freely copied. It is empty, alive or dead: one whose track the host has removed
 /// dies when the project tells of the change, and never comes back. Without a track, questions are answered by -1, 0.0,
@@ -35,7 +36,7 @@ public:
 
     Track() = default;
     /// Both may be null, for an empty handle.
-    Track(Project* project, Velmark::ITrackNode* track);
+    Track(TrackProject* project, Velmark::ITrackNode* track);
     Track(const Track& other);
     Track& operator=(const Track& other);
     ~Track() override;
@@ -129,7 +130,7 @@ private:
                         const std::vector<Velmark::Counted<Velmark::IProjectNode>>& children);
     void noteChange();
 
-    Project* m_project = nullptr;
+    TrackProject* m_project = nullptr;
     mutable Velmark::Counted<Velmark::ITrackNode> m_track;
     mutable bool m_needsCheck = false;
 };

@@ -10,21 +10,9 @@ namespace {
 
 const wchar_t* untranslatedName(std::int32_t role)
 {
+    if (const core::MarkerTrack* const markers = core::MarkerTrack::ofRole(role))
+        return markers->name;
     switch (role) {
-    case TrackRole::Destination:
-        return L"Destination";
-    case TrackRole::DissolveWipe:
-        return L"Dissolve/Wipe";
-    case TrackRole::Insert:
-        return L"Insert";
-    case TrackRole::AutomationWarning:
-        return L"Automation Warning";
-    case TrackRole::AudioSnippet:
-        return L"Audio Snippet";
-    case TrackRole::Overlap:
-        return L"Overlap";
-    case TrackRole::Memos:
-        return L"Memos";
     case TrackRole::NewVideo:
         return L"New Video";
     case TrackRole::Markers:

@@ -2,6 +2,8 @@
 
 #pragma once
 
+#include "core/cut/MarkerTrack.h"
+
 #include <cstdint>
 #include <string>
 
@@ -10,13 +12,13 @@ namespace cadrel::host {
 /// What a track is for that the system writes on. The number is stored with the track.
 struct TrackRole {
     enum Type : std::int32_t {
-        Destination = 1,
-        DissolveWipe = 2,
-        Insert = 3,
-        AutomationWarning = 4,
-        AudioSnippet = 5,
-        Overlap = 6,
-        Memos = 7,
+        Destination = core::MarkerTracks.front().role,
+        DissolveWipe = core::MarkerTrack::ofKind(core::MarkerKind::DissolveWipe).role,
+        Insert = core::MarkerTrack::ofKind(core::MarkerKind::Insert).role,
+        AutomationWarning = core::MarkerTrack::ofKind(core::MarkerKind::AutomationWarning).role,
+        AudioSnippet = core::MarkerTrack::ofKind(core::MarkerKind::AudioSnippet).role,
+        Overlap = core::MarkerTrack::ofKind(core::MarkerKind::Overlap).role,
+        Memos = core::MarkerTracks.back().role,
         NewVideo = 8,
         Markers = 9, ///< the folder of the marker tracks
         OldVideo = 10,

@@ -12,6 +12,8 @@
 #include "velmark/Context.h"
 #include "velmark/Editing.h"
 
+#include <limits>
+
 using namespace Velmark;
 
 namespace cadrel::host {
@@ -32,9 +34,9 @@ VideoSourceTrack::~VideoSourceTrack()
 void VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
 {
     const core::VideoList* const list = m_source.videoList();
-    if (!list || list->isEmpty() || !m_track.isAlive())
+    if (!list || list->isEmpty() || !m_track.isAlive() || m_track.hostLocked())
         return;
-    m_track.removeAll(transaction);
+    clear(transaction);
     MediaPool* const pool = m_source.mediaPool();
     if (!pool || VideoTrackHandler::isTurnedOff(m_track))
         return;
@@ -46,6 +48,14 @@ void VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
         event.setClip(pool->findClip(entry).get(), 0);
         requireOk(transaction.insert(m_track.container().get(), event.node()));
     }
+}
+
+void VideoSourceTrack::clear(IEditTransaction& transaction)
+{
+    if (m_offset == 0.0)
+        m_track.removeAll(transaction);
+    else
+        m_track.removeRange(transaction, m_offset, std::numeric_limits<double>::infinity());
 }
 
 void VideoSourceTrack::tracksChanged()

@@ -29,13 +29,16 @@ public:
 
     /// How much later than in the list the videos are written, in seconds.
     void setOffset(double seconds) { m_offset = seconds; }
-    /// Replaces what stands on the track by the videos of the list; does nothing for an empty one. A track on which the user
-    /// has put another video is left empty.
+    /// Replaces what stands on the track by the videos of the list; does nothing for an empty one, nor on a track that the
+    /// user has locked. With an offset only what starts there or later is replaced, as the real programme isn't written. On
+    /// a track on which the user has put another video nothing is put in the place of what goes.
     void writeVideoEvents(Velmark::IEditTransaction& transaction);
 
     void tracksChanged() override;
 
 private:
+    void clear(Velmark::IEditTransaction& transaction);
+
     Velmark::IHostContext* m_hostContext;
     PoolVideoSource& m_source;
     VideoTrackHandler& m_handler;

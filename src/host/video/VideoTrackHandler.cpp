@@ -74,7 +74,7 @@ std::int32_t VideoTrackHandler::getMode(std::size_t channel)
     case TrackRole::NewVideo:
         return isTurnedOff(asked) ? Mode::NewOff : Mode::New;
     default:
-        return channel == 0 ? Mode::Old : Mode::New;
+        return Mode::None;
     }
 }
 
@@ -103,19 +103,25 @@ Track VideoTrackHandler::trackFor(std::int32_t mode, bool lenient)
         if (pictureOf(candidate) == picture)
             return lenient || candidate.role() == role ? candidate : Track();
     }
-    if (mode != Mode::Old && mode != Mode::New)
+    switch (mode) {
+    case Mode::Old:
+        return !hasPicture(m_tracks[0]) ? m_tracks[0] : Track();
+    case Mode::New:
+        return {};
+    default:
         throw Result::NotAvailable;
-    // By the order of the channels; but never the track of the other picture.
-    const Track& byOrder = m_tracks[mode == Mode::Old ? 0 : 1];
-    return !hasPicture(byOrder) ? byOrder : Track();
+    }
 }
 
 void VideoTrackHandler::rebuild(Project* project)
 {
     std::vector<Track> tracks = project ? project->tracksOfType(TypeWord::Video) : std::vector<Track>();
+    // Of more than two, at least one has no picture or that of an earlier track.
     while (tracks.size() > ChannelCount) {
-        const auto lastWithout = std::find_if_not(tracks.rbegin(), tracks.rend(), hasPicture);
-        tracks.erase(lastWithout == tracks.rend() ? tracks.end() - 1 : lastWithout.base() - 1);
+        const auto isFirstOfItsPicture = [&tracks](const Track& track) {
+            return hasPicture(track) && std::ranges::find(tracks, pictureOf(track), pictureOf)->node() == track.node();
+        };
+        tracks.erase(std::find_if_not(tracks.rbegin(), tracks.rend(), isFirstOfItsPicture).base() - 1);
     }
     tracks.resize(ChannelCount);
     std::copy(tracks.begin(), tracks.end(), m_tracks.begin());

@@ -14,8 +14,9 @@
 
 namespace cadrel::host {
 
-/// The channels over the video tracks of a project. What a track carries is kept in its role; a track that nobody has
-/// given a role counts as the old picture on the first channel and as the new one on the second.
+/// The channels over the video tracks of a project. What a track carries is kept in its role. Of a track without one nobody
+/// knows: it is never that of the new picture, on which runs write; but the old picture is looked for on the first channel
+/// where no track has its role.
 class VideoTrackHandler : public gui::VideoTrackHandlerBase, public ProjectListener {
 public:
     static constexpr std::size_t ChannelCount = 2;
@@ -37,12 +38,13 @@ public:
     static bool isTurnedOff(const Track& track);
 
     /// The track of that mode, an empty handle when there is none. A lenient search for Old or New also takes one that is
-    /// turned off, and one for OldOff or NewOff one that isn't. Throws Result::NotAvailable for these two when no track has
+    /// turned off, and one for OldOff or NewOff one that isn't. Where no track has the role of the old picture, Old finds the
+    /// first channel's, unless that is the new picture's. Throws Result::NotAvailable for these two when no track has
     /// a role for that picture.
     Track trackFor(std::int32_t mode, bool lenient);
 
-    /// Puts the first two video tracks of the project on the channels; null empties them. Where there are more, those that
-    /// have a role go before those that have none.
+    /// Puts the first two video tracks of the project on the channels; null empties them. Where there are more, the first
+    /// track of the old picture and the first of the new one go before all others.
     void rebuild(Project* project);
 
     void projectChanging(Project&) override {}

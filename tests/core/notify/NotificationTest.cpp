@@ -90,6 +90,22 @@ TEST(ChangeContext, OfEachClassHasItsTypeAndField)
     EXPECT_EQ(EventChangeContext().type, 3);
     EXPECT_EQ(ActionChangeContext(1).type, 6);
     EXPECT_EQ(ActionChangeContext(1).action, 1);
+    EXPECT_EQ(ActionChangeContext::Preview, 0);
+    EXPECT_EQ(ActionChangeContext::Run, 1);
+}
+
+TEST(ChangeContext, OfAJobTellsHowItEnded)
+{
+    EXPECT_EQ(ActionChangeContext(1).result, Result::Ok);
+    EXPECT_FALSE(ActionChangeContext(1).isDropped);
+    EXPECT_EQ(ActionChangeContext(0, Result::HostCallFailed).result, Result::HostCallFailed);
+    EXPECT_FALSE(ActionChangeContext(0, Result::Cancelled).isDropped);
+
+    const ActionChangeContext dropped = ActionChangeContext::dropped(ActionChangeContext::Preview);
+    EXPECT_EQ(dropped.type, 6);
+    EXPECT_EQ(dropped.action, 0);
+    EXPECT_EQ(dropped.result, Result::Cancelled);
+    EXPECT_TRUE(dropped.isDropped);
 }
 
 TEST(Notification, DoesNothingWithoutListeners)

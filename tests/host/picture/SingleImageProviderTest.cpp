@@ -2,7 +2,7 @@
 
 #include "host/picture/SingleImageProvider.h"
 
-#include "gui/video/VideoProviderBase.h"
+#include "gui/picture/VideoProviderBase.h"
 #include "tests/host/picture/FakeThumbnails.h"
 #include "tests/support/PlainConverter.h"
 #include "util/Result.h"

@@ -390,7 +390,7 @@ TEST_P(MemoSyncTest, FindsTheMemosOfAProjectThatWasOpenedAnew)
 {
     addMemo(u"cue", 12.0);
     preview({tenSeconds()});
-    Project reopened(host.context(), host.document(), nullptr);
+    Project reopened(host.context(), host.document());
     reopened.computePreviewOffset();
     reopened.model().setProperty(core::PropertyKey::PreviewOffset, core::Variant(Day));
     reopened.model().setPreviewActive(true);

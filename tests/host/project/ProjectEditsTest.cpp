@@ -279,7 +279,7 @@ TEST_P(ProjectEditsTest, TracksOfTheSameSourceRangeAreCopiedTogether)
     AlteredContext altered(host.context());
     const auto edits = makeCounted<EditRecorder>();
     altered.replace(IEditService::iid, edits);
-    Project project(&altered, host.document(), nullptr);
+    Project project(&altered, host.document());
     switchMarkersOff(project.model().settings());
     project.computePreviewOffset();
     const auto cut = project.makeCut(tenSeconds());
@@ -311,7 +311,7 @@ TEST_P(ProjectEditsTest, AnEmptyOrReversedSourceIsPassedOver)
     AlteredContext altered(host.context());
     const auto edits = makeCounted<EditRecorder>();
     altered.replace(IEditService::iid, edits);
-    Project project(&altered, host.document(), nullptr);
+    Project project(&altered, host.document());
     switchMarkersOff(project.model().settings());
     project.computePreviewOffset();
     const auto cut = project.makeCut(tenSeconds());
@@ -330,7 +330,7 @@ TEST_P(ProjectEditsTest, ACutFailsWithoutItsHost)
     AlteredContext altered(host.context());
     const auto edits = makeCounted<EditRecorder>();
     edits->result = ResultFalse;
-    Project project(&altered, host.document(), nullptr);
+    Project project(&altered, host.document());
     switchMarkersOff(project.model().settings());
     const auto cut = project.makeCut(tenSeconds());
     const auto processed = [&] { return thrownBy([&] { project.processCut(*host.transaction(), *cut); }); };
@@ -576,7 +576,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunReadsNothingThatStandsBeforeThePreview)
     AlteredContext altered(host.context());
     const auto edits = makeCounted<EditRecorder>();
     altered.replace(IEditService::iid, edits);
-    Project project(&altered, host.document(), nullptr);
+    Project project(&altered, host.document());
     project.computePreviewOffset();
     project.model().settings().setRestrictRange(true);
     project.model().settings().setPreserveMaterial(-100.0, 3620.0);
@@ -619,6 +619,22 @@ TEST_P(ProjectEditsTest, TheEndOfARunReportsEachTrack)
     complete();
 
     EXPECT_EQ(progress.steps(), 2U);
+}
+
+TEST_P(ProjectEditsTest, WritesNoMarkersOnATrackThatTheUserHasLocked)
+{
+    createMarkerTracks();
+    lock(markerTrack(u"Destination"));
+    lock(markerTrack(u"Insert"));
+
+    EXPECT_EQ(process(*host.adapter.makeCut(tenSeconds())), Result::Ok);
+    EXPECT_EQ(generate({{3601.0, 3602.0, "Insert: B", MarkerKind::Insert},
+                        {3602.0, 3603.0, "Dissolve", MarkerKind::DissolveWipe}}),
+              Result::Ok);
+
+    EXPECT_TRUE(contentOf(markerTrack(u"Destination")).empty());
+    EXPECT_TRUE(contentOf(markerTrack(u"Insert")).empty());
+    EXPECT_EQ(contentOf(markerTrack(u"Dissolve/Wipe")), Content{"preview: Dissolve 2-3"});
 }
 
 TEST_P(ProjectEditsTest, ClearsThePreviewAndUnlocksTheTracks)
@@ -675,7 +691,7 @@ TEST_P(ProjectEditsTest, ClosesARangeOnTheTracksOfTheRunInTimesOfTheHost)
     AlteredContext altered(host.context());
     const auto edits = makeCounted<EditRecorder>();
     altered.replace(IEditService::iid, edits);
-    Project project(&altered, host.document(), nullptr);
+    Project project(&altered, host.document());
 
     project.closeRange(false, 3610.0, 3620.0);
     project.closeRange(true, 3610.0, 3620.0);
@@ -692,7 +708,7 @@ TEST_P(ProjectEditsTest, ClosingARangeFailsOnlyWhereTheHostRefuses)
     AlteredContext altered(host.context());
     const auto edits = makeCounted<EditRecorder>();
     altered.replace(IEditService::iid, edits);
-    Project project(&altered, host.document(), nullptr);
+    Project project(&altered, host.document());
     const auto closing = [&](int32 result) {
         edits->result = result;
         return thrownBy([&] { project.closeRange(false, 3610.0, 3620.0); });

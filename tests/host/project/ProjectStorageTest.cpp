@@ -123,7 +123,7 @@ protected:
     /// What a project that the host opens throws at loading, with its model empty in any case.
     Result::Type loadFailure()
     {
-        Project opened(host.context(), host.document(), nullptr);
+        Project opened(host.context(), host.document());
         const Bytes fresh = contentOf(opened.model());
         const Result::Type failure = thrownBy([&] { opened.load(); });
         EXPECT_EQ(contentOf(opened.model()), fresh);
@@ -157,7 +157,7 @@ TEST_F(ProjectStorageTest, ReadsBackWhatItHasStored)
 {
     host.adapter.save();
 
-    Project opened(host.context(), host.document(), nullptr);
+    Project opened(host.context(), host.document());
     opened.load();
 
     EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
@@ -172,7 +172,7 @@ TEST_F(ProjectStorageTest, WhatItHasStoredIsInTheProjectFile)
     host.application.saveProject(host.project, file);
 
     standin::Project& reopened = host.application.openProject(file);
-    Project opened(host.context(), &reopened, nullptr);
+    Project opened(host.context(), &reopened);
     opened.load();
 
     EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
@@ -218,7 +218,7 @@ TEST_F(ProjectStorageTest, OnlyTheLow32BitsOfTheChecksumCount)
     for (const std::int64_t above : {std::int64_t{1} << 32, std::int64_t{-1} << 32}) {
         store(block, above | archiveOf(block).crc32());
 
-        Project opened(host.context(), host.document(), nullptr);
+        Project opened(host.context(), host.document());
         opened.load();
 
         EXPECT_EQ(contentOf(opened.model()), block);
@@ -228,7 +228,7 @@ TEST_F(ProjectStorageTest, OnlyTheLow32BitsOfTheChecksumCount)
 TEST_F(ProjectStorageTest, ASaveAfterAFailedLoadReplacesWhatWasStored)
 {
     store(contentOf(host.adapter.model()), 0);
-    Project opened(host.context(), host.document(), nullptr);
+    Project opened(host.context(), host.document());
     EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::ChecksumMismatch);
 
     opened.model().newEdl().add(makeEvent("B", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00", 1));
@@ -262,7 +262,7 @@ TEST_F(ProjectStorageTest, AnOlderVersionIsRead)
     block[0] = 0;
     store(block);
 
-    Project opened(host.context(), host.document(), nullptr);
+    Project opened(host.context(), host.document());
     opened.load();
 
     EXPECT_EQ(opened.model().changeEdl().size(), 1U);
@@ -312,7 +312,7 @@ TEST_F(ProjectStorageTest, WhatIsStoredHasToBeAList)
                                   FVariant::object(nullptr), FVariant::object(host.document())}) {
         const auto project = makeCounted<UnreliableProject>();
         project->value = value;
-        EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostObjectMissing);
+        EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).load(); }), Result::HostObjectMissing);
     }
 }
 
@@ -329,21 +329,21 @@ TEST_F(ProjectStorageTest, FailsWhereTheHostGivesNothing)
 {
     const auto project = makeCounted<UnreliableProject>();
     project->value = FVariant::object(query<IAttributeData>(makeCounted<StubbornList>()).get());
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostCallFailed);
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).load(); }), Result::HostCallFailed);
 
     project->readResult = ResultFalse;
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostCallFailed);
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).load(); }), Result::HostCallFailed);
 
     project->isNode = false;
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).load(); }), Result::HostObjectMissing);
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).save(); }), Result::HostObjectMissing);
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).load(); }), Result::HostObjectMissing);
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).save(); }), Result::HostObjectMissing);
 }
 
 TEST_F(ProjectStorageTest, ASaveThatFailsLeavesNothingStored)
 {
     host.adapter.save();
     AlteredContext altered(host.context());
-    Project project(&altered, host.document(), nullptr);
+    Project project(&altered, host.document());
 
     altered.hide(IAttributeData::iid);
     EXPECT_EQ(thrownBy([&] { project.save(); }), Result::HostObjectMissing);
@@ -357,19 +357,19 @@ TEST_F(ProjectStorageTest, ASaveFailsWhereTheHostTakesNothing)
 {
     AlteredContext altered(host.context());
     altered.replace(IAttributeData::iid, makeCounted<StubbornList>());
-    EXPECT_EQ(thrownBy([&] { Project(&altered, host.document(), nullptr).save(); }), Result::HostCallFailed);
+    EXPECT_EQ(thrownBy([&] { Project(&altered, host.document()).save(); }), Result::HostCallFailed);
 
     const auto project = makeCounted<UnreliableProject>();
     project->refusedKey = AttributeKey::Storage;
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).save(); }), Result::HostCallFailed);
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).save(); }), Result::HostCallFailed);
     EXPECT_TRUE(project->keptKeys.empty());
 
     project->refusedKey = AttributeKey::StorageChecksum;
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get(), nullptr).save(); }), Result::HostCallFailed);
+    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).save(); }), Result::HostCallFailed);
     EXPECT_TRUE(project->keptKeys.empty());
 
     project->refusedKey = "";
-    Project(host.context(), project.get(), nullptr).save();
+    Project(host.context(), project.get()).save();
     EXPECT_EQ(project->keptKeys, (std::set<std::string>{AttributeKey::Storage, AttributeKey::StorageChecksum}));
 }
 
@@ -384,7 +384,7 @@ TEST_F(ProjectStorageTest, ReadsTheTimecodesUnderTheRateOfItsOwnProject)
     host.project.setFrameRate({30.0, 0});
     timecodes.framerate = core::Framerate(25, 0);
 
-    Project opened(host.context(), host.document(), nullptr);
+    Project opened(host.context(), host.document());
     opened.load();
 
     EXPECT_TRUE(opened.model().newEdl().at(0).isValid());
@@ -409,7 +409,7 @@ TEST_F(ProjectStorageTest, FindsTheTracksThatItHeldLocked)
     host.adapter.model().setPreviewActive(true);
     host.adapter.save();
 
-    Project opened(host.context(), host.document(), nullptr);
+    Project opened(host.context(), host.document());
     opened.load();
     EXPECT_TRUE(host.handle(held).hostLocked()) << "The preview goes on.";
     opened.setTracksLocked(false);
@@ -451,11 +451,11 @@ TEST_F(ProjectStorageTest, UnlocksWhatItHeldForAPreviewThatIsGone)
 TEST_F(ProjectStorageTest, GivesAnEmptyModelWhereTheTracksCannotBeRead)
 {
     const auto project = FakeProject::withoutUsableTrack();
-    Project opened(host.context(), project.get(), nullptr);
+    Project opened(host.context(), project.get());
 
     EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::HostObjectMissing);
 
-    EXPECT_EQ(contentOf(opened.model()), contentOf(Project(host.context(), project.get(), nullptr).model()));
+    EXPECT_EQ(contentOf(opened.model()), contentOf(Project(host.context(), project.get()).model()));
 }
 
 } // namespace cadrel::host

@@ -241,7 +241,7 @@ TEST_P(ProjectTimesTest, AListenerThatFailsKeepsNoOtherFromBeingTold)
 TEST_P(ProjectTimesTest, TellsItsListenersOfAnEditThatTheMemosCannotFollow)
 {
     const auto broken = FakeProject::withoutUsableTrack();
-    Project project(host.context(), broken.get(), nullptr);
+    Project project(host.context(), broken.get());
     project.model().setPreviewActive(true);
     project.model().setProperty(core::PropertyKey::PreviewOffset, core::Variant(Day));
     Told listener;
@@ -375,7 +375,7 @@ TEST_P(ProjectTimesTest, TheProjectEndStaysWithoutPreview)
 TEST_P(ProjectTimesTest, TheProjectEndCannotBeExtendedWithoutAnOffset)
 {
     const auto document = makeCounted<AlteredDocument>(host.document());
-    Project project(host.context(), document.get(), nullptr);
+    Project project(host.context(), document.get());
     project.model().setPreviewActive(true);
     EXPECT_EQ(thrownBy([&] { project.extendProjectEnd(false); }), Result::NotAvailable);
 
@@ -417,7 +417,7 @@ TEST_P(ProjectTimesTest, LocatorsCanBeMissingOrRefused)
 {
     const auto document = makeCounted<AlteredDocument>(host.document());
     document->hasLocators = false;
-    Project project(host.context(), document.get(), nullptr);
+    Project project(host.context(), document.get());
     double left = 0.0;
     double right = 0.0;
 
@@ -432,7 +432,7 @@ TEST_P(ProjectTimesTest, NeedsBothLocators)
         const auto locators = makeCounted<LocatorsBut>(host.document()->getLocators(), missing);
         const auto document = makeCounted<AlteredDocument>(host.document());
         document->locators = locators.get();
-        Project project(host.context(), document.get(), nullptr);
+        Project project(host.context(), document.get());
         double left = 0.0;
         double right = 0.0;
 

@@ -3,7 +3,6 @@
 #include "host/project/Project.h"
 
 #include "host/border/HostFailure.h"
-#include "host/picture/VideoProvider.h"
 #include "standin/project/Track.h"
 #include "tests/host/project/AlteredDocument.h"
 #include "tests/support/ThrownResult.h"
@@ -70,14 +69,25 @@ public:
     int32 getFlag(const char*) override { return isLocked ? ResultOk : ResultFalse; }
     int32 getAttribute(const char* key, FVariant& value) override
     {
+        if (std::string(key) == AttributeKey::LockState) {
+            value = FVariant::integer(m_lockState);
+            return ResultOk;
+        }
         if (m_videoRole == 0 || std::string(key) != AttributeKey::VideoType)
             return ResultFalse;
         value = FVariant::integer(m_videoRole);
         return ResultOk;
     }
+    int32 setAttribute(const char* key, const FVariant& value, bool) override
+    {
+        if (setterResult == ResultOk && std::string(key) == AttributeKey::LockState)
+            m_lockState = value.asInteger();
+        return setterResult;
+    }
 
 private:
     std::int32_t m_videoRole;
+    std::int64_t m_lockState = 0;
 };
 
 /// With a clock that begins at 0 and with one that begins at 01:00:00:00.
@@ -278,7 +288,7 @@ TEST_P(ProjectTracksTest, FindsItsTracksAgainByTheirRoles)
     createMarkerTracks();
     trackNamed(u"Insert").setName(L"What is new");
     const std::string before = host.dump();
-    Project reopened(host.context(), host.document(), nullptr);
+    Project reopened(host.context(), host.document());
 
     createMarkerTracks(reopened);
 
@@ -346,7 +356,7 @@ TEST_P(ProjectTracksTest, TakesTheMarkerTrackThatTheHostHasReady)
     const auto ready = makeCounted<standin::MarkerTrack>();
     const auto document = makeCounted<AlteredDocument>(host.document());
     document->defaultMarkerTrack = ready.get();
-    Project project(host.context(), document.get(), nullptr);
+    Project project(host.context(), document.get());
     project.setUseTrackCache(true);
     project.allTracks();
 
@@ -395,7 +405,7 @@ TEST_P(ProjectTracksTest, GivesEveryMemoOfTheRealProgrammeAnIdOfItsOwn)
 TEST_P(ProjectTracksTest, FailsWhereTheHostMakesNoTrack)
 {
     const auto document = makeCounted<AlteredDocument>(host.document());
-    Project project(host.context(), document.get(), nullptr);
+    Project project(host.context(), document.get());
     IEditTransaction& transaction = *host.transaction();
 
     document->makesTracks = false;
@@ -431,22 +441,20 @@ TEST_P(ProjectTracksTest, MakesATrackForTheNewVideosOnce)
     EXPECT_TRUE(trackNamed(u"New Video").isVideo());
 }
 
-TEST_P(ProjectTracksTest, TheSecondVideoTrackIsThatOfTheNewPicture)
+TEST_P(ProjectTracksTest, AVideoTrackIsThatOfTheNewPictureByItsRoleAlone)
 {
-    VideoProvider provider(host.context());
-    Project project(host.context(), host.document(), &provider);
-    addVideo(project);
+    addVideo(host.adapter);
     host.addTrack(TypeWord::Video, u"Picture");
-    provider.setProject(&project);
-    createVideoTracks(project);
-    EXPECT_EQ(namesOf(*host.root()), (Names{u"Picture", u"New Video"}));
-
-    host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), find(u"New Video").get())); });
     host.addTrack(TypeWord::Video, u"Conform");
-    provider.setProject(&project);
-    createVideoTracks(project);
-    EXPECT_EQ(namesOf(*host.root()), (Names{u"Picture", u"Conform"}));
-    provider.setProject(nullptr);
+    const auto old = host.addTrack(TypeWord::Video, u"Old");
+    host.handle(old).setRole(TrackRole::OldVideo);
+
+    createVideoTracks(host.adapter);
+
+    EXPECT_EQ(namesOf(*host.root()), (Names{u"Picture", u"Conform", u"Old", u"New Video"}));
+    EXPECT_EQ(trackNamed(u"Picture").role(), -1);
+    EXPECT_EQ(trackNamed(u"Conform").role(), -1);
+    EXPECT_EQ(trackNamed(u"Old").role(), TrackRole::OldVideo);
 }
 
 TEST_P(ProjectTracksTest, ATrackOfTheUsersOwnVideoCountsAsThatOfTheNewPicture)
@@ -500,6 +508,54 @@ TEST_P(ProjectTracksTest, LeavesTracksAloneThatTheUserHasLocked)
     EXPECT_TRUE(host.handle(fx).hostLocked());
 }
 
+TEST_P(ProjectTracksTest, LeavesItsOwnTracksAloneThatTheUserHasLocked)
+{
+    addVideo(host.adapter);
+    createVideoTracks(host.adapter);
+    createMarkerTracks();
+    for (const char16_t* name : {u"New Video", u"Insert"})
+        requireOk(query<ITrackNode>(find(name))->setFlag(TrackFlag::Lock, true));
+
+    host.adapter.setTracksLocked(false);
+    for (const char16_t* name : {u"New Video", u"Insert"})
+        EXPECT_TRUE(trackNamed(name).hostLocked());
+
+    host.adapter.setTracksLocked(true);
+    EXPECT_TRUE(trackNamed(u"Overlap").hasLockState());
+    for (const char16_t* name : {u"New Video", u"Insert"})
+        EXPECT_FALSE(trackNamed(name).hasLockState()) << "It is the user's lock.";
+
+    host.adapter.setTracksLocked(false);
+    EXPECT_FALSE(trackNamed(u"Overlap").hostLocked());
+    for (const char16_t* name : {u"New Video", u"Insert"})
+        EXPECT_TRUE(trackNamed(name).hostLocked());
+}
+
+TEST_P(ProjectTracksTest, LeavesAVideoTrackAloneThatHasNoRole)
+{
+    const auto own = host.addTrack(TypeWord::Video, u"Picture");
+    const auto second = host.addTrack(TypeWord::Video, u"Conform");
+    requireOk(query<ITrackNode>(second)->setFlag(TrackFlag::Lock, true));
+
+    host.adapter.setTracksLocked(true);
+    EXPECT_FALSE(host.handle(own).hostLocked());
+
+    host.adapter.setTracksLocked(false);
+    EXPECT_TRUE(host.handle(second).hostLocked());
+}
+
+TEST_P(ProjectTracksTest, TakesItsOwnMarkBackWhereTheUserHasUnlocked)
+{
+    const auto fx = host.addTrack(TypeWord::Audio, u"FX");
+    host.adapter.collectLockTracks();
+    host.adapter.setTracksLocked(true);
+    requireOk(query<ITrackNode>(fx)->setFlag(TrackFlag::Lock, false));
+
+    host.adapter.setTracksLocked(false);
+
+    EXPECT_FALSE(host.handle(fx).hasLockState());
+}
+
 TEST_P(ProjectTracksTest, LocksOnlySelectedTracksWhereARunChangesOnlyThose)
 {
     host.adapter.model().settings().setApplyTo(core::ApplyTo::SelectedTracks);
@@ -542,7 +598,7 @@ TEST_P(ProjectTracksTest, FindsItsOwnTracksBeforeItLocksThem)
     addVideo(host.adapter);
     createVideoTracks(host.adapter);
     createMarkerTracks();
-    Project reopened(host.context(), host.document(), nullptr);
+    Project reopened(host.context(), host.document());
 
     reopened.setTracksLocked(true);
 
@@ -572,7 +628,7 @@ TEST_P(ProjectTracksTest, ATrackThatRefusesDoesNotKeepTheOthersFromBeingLocked)
     const auto last = makeCounted<LockTrack>(audio, 0);
     const auto document = makeCounted<FakeProject>(GetParam());
     document->children = {first, refusing, last};
-    Project project(host.context(), document.get(), nullptr);
+    Project project(host.context(), document.get());
     project.collectLockTracks();
     refusing->setterResult = ResultFalse;
 
@@ -581,8 +637,12 @@ TEST_P(ProjectTracksTest, ATrackThatRefusesDoesNotKeepTheOthersFromBeingLocked)
     EXPECT_FALSE(refusing->isLocked);
     EXPECT_TRUE(last->isLocked);
 
+    refusing->setterResult = ResultOk;
+    project.setTracksLocked(true);
+    refusing->setterResult = ResultFalse;
     EXPECT_EQ(thrownBy([&] { project.setTracksLocked(false); }), Result::HostCallFailed);
     EXPECT_FALSE(first->isLocked);
+    EXPECT_TRUE(refusing->isLocked);
     EXPECT_FALSE(last->isLocked);
 }
 
@@ -594,7 +654,7 @@ TEST_P(ProjectTracksTest, AMarkerTrackThatCannotBeReadDoesNotKeepThePictureFromB
         makeCounted<LockTrack>(std::set<std::string>{TypeWord::Track, TypeWord::Video}, TrackRole::NewVideo);
     const auto document = makeCounted<FakeProject>(GetParam());
     document->children = {unreadable, video};
-    Project project(host.context(), document.get(), nullptr);
+    Project project(host.context(), document.get());
 
     EXPECT_EQ(thrownBy([&] { project.setTracksLocked(true); }), Result::NotSupported);
 
@@ -604,7 +664,7 @@ TEST_P(ProjectTracksTest, AMarkerTrackThatCannotBeReadDoesNotKeepThePictureFromB
 TEST_P(ProjectTracksTest, AllTracksHaveToBeUsableAsSuch)
 {
     const auto document = FakeProject::withoutUsableTrack();
-    Project project(host.context(), document.get(), nullptr);
+    Project project(host.context(), document.get());
 
     EXPECT_EQ(thrownBy([&] { project.allTracks(); }), Result::HostObjectMissing);
 }

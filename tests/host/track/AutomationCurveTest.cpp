@@ -155,7 +155,7 @@ TEST_P(AutomationCurveTest, RefusesWhatIsNoCurve)
 TEST_P(AutomationCurveTest, RefusesATrackWhoseAutomationIsNone)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto node = makeCounted<FakeNode>();
     node->automation = create<IObjectList>(host.context());
     const Track track(&adapter, node.get());
@@ -295,7 +295,7 @@ TEST_P(AutomationCurveTest, MissesPointsWhereTheHostMakesNone)
     host.set(Volume, {{10.0, 0.25F}});
     AlteredContext context(host.context());
     context.hide(ClassId::AutomationPoint);
-    Project adapter(&context, host.document(), nullptr);
+    Project adapter(&context, host.document());
     const Track track(&adapter, query<ITrackNode>(host.node).get());
     auto curves = track.prepareVirginRange();
 

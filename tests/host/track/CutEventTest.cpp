@@ -269,7 +269,7 @@ TEST_P(CutEventTest, MissesTheTrackThatHasGone)
 TEST_P(CutEventTest, FailsBehindEventsInNoOrder)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto track = makeCounted<FakeNode>();
     track->children = {makeCounted<FakeNode>(1.0, 2.0), makeCounted<FakeNode>(4.0, 6.0),
                        makeCounted<FakeNode>(3.0, 8.0)};

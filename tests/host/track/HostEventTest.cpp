@@ -307,7 +307,7 @@ TEST_P(HostEventTest, RefusesANegativeUserId)
 TEST_P(HostEventTest, ReportsWhatTheHostRefusesToWriteDown)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto node = makeCounted<FakeNode>();
     const Track track(&adapter, node.get());
     HostEvent event(track, node);

@@ -265,7 +265,7 @@ TEST_P(TrackEventsTest, TracksOfOtherKindsHaveNoEventsOfTheirKind)
 TEST_P(TrackEventsTest, EventsOfAnotherKindThanTheTrackAreLeftOut)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto node = makeCounted<FakeNode>();
     node->words = {TypeWord::Track, TypeWord::Audio};
     node->children = {makeCounted<FakeNode>(1.0, 2.0), makeCounted<FakeNode>(3.0, 4.0)};
@@ -457,7 +457,7 @@ TEST_P(TrackEventsTest, TheSpanOfAnEventEndsWithTheOutermostPartAroundIt)
 TEST_P(TrackEventsTest, TheSpanOfAnEventIsMovedByAPartThatTheHostDoesNotCallAnOwner)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto track = makeCounted<FakeNode>(7.0, 300.0);
     const auto part = makeCounted<FakeNode>(100.0, 200.0);
     part->words = {TypeWord::Part};
@@ -484,7 +484,7 @@ TEST_P(TrackEventsTest, TheSpanOfAnEventIsMovedByAPartThatTheHostDoesNotCallAnOw
 TEST_P(TrackEventsTest, AnEventThatEndsBeforeItStartsHasNoSpan)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto track = makeCounted<FakeNode>();
     const Track handle(&adapter, track.get());
 

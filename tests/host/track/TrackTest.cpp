@@ -249,7 +249,7 @@ TEST_P(TrackTest, AnAssignedHandleListensToTheProjectThatItComesFrom)
     Track track;
 
     {
-        Project other(host.context(), &otherProject, nullptr);
+        Project other(host.context(), &otherProject);
         track = Track(&other, otherNode.get());
         track = host.handle(node);
     }
@@ -263,8 +263,8 @@ TEST_P(TrackTest, AnAssignedHandleNoLongerListensToItsFormerProject)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
     const auto formerProject = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
-    Project former(host.context(), formerProject.get(), nullptr);
+    Project adapter(host.context(), project.get());
+    Project former(host.context(), formerProject.get());
     const auto node = makeCounted<FakeNode>();
     node->flags = ChangeFlag::Removed;
     Track track(&former, makeCounted<FakeNode>().get());
@@ -296,7 +296,7 @@ TEST_P(TrackTest, HandlesGiveTheirReferencesBack)
     const auto node = makeCounted<FakeNode>();
     project->children.push_back(node);
     {
-        Project adapter(host.context(), project.get(), nullptr);
+        Project adapter(host.context(), project.get());
         const Track track(&adapter, node.get());
         const Track copy = track;
         EXPECT_TRUE(copy.isAlive());
@@ -308,7 +308,7 @@ TEST_P(TrackTest, HandlesGiveTheirReferencesBack)
 TEST_P(TrackTest, ATrackWhoseFlagsCannotBeAskedIsLookedFor)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto lost = makeCounted<FakeNode>();
     const auto found = makeCounted<FakeNode>();
     project->children.push_back(found);
@@ -344,7 +344,7 @@ TEST_P(TrackTest, KnowsTheKindOfItsTrack)
 TEST_P(TrackTest, IsOfAKindOnlyIfItIsATrackToo)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto node = makeCounted<FakeNode>();
     const Track track(&adapter, node.get());
 
@@ -395,7 +395,7 @@ TEST_P(TrackTest, ReadsAndWritesItsName)
 TEST_P(TrackTest, ReportsWhatTheHostRefuses)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto node = makeCounted<FakeNode>();
     node->words = {TypeWord::Track, TypeWord::Marker};
     Track track(&adapter, node.get());
@@ -414,7 +414,7 @@ TEST_P(TrackTest, MissesAContainerThatTheHostHasNot)
 {
     const auto project = makeCounted<FakeProject>(GetParam());
     project->hasContainers = false;
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     const auto node = makeCounted<FakeNode>();
     node->children.push_back(makeCounted<FakeNode>(1.0, 2.0));
     Track track(&adapter, node.get());
@@ -522,7 +522,7 @@ TEST_P(TrackTest, HoldsATrackThatTheUserHadLockedFromThenOnAlsoAfterALoad)
     host.application.saveProject(host.project, file);
     standin::Project& loaded = host.application.openProject(file);
 
-    Project adapter(host.context(), &loaded, nullptr);
+    Project adapter(host.context(), &loaded);
     const Track loadedTrack(&adapter, loaded.allTracks().at(0));
     EXPECT_TRUE(loadedTrack.hostLocked());
     EXPECT_TRUE(loadedTrack.hasLockState());

@@ -112,6 +112,64 @@ TEST_P(VideoSourceTrackTest, ReplacesWhatStoodOnTheTrack)
     EXPECT_EQ(host.dump(), before);
 }
 
+TEST_P(VideoSourceTrackTest, WithAnOffsetReplacesOnlyWhatStartsThereOrLater)
+{
+    // Half a minute later than the clock's beginning; the first video is written ten seconds behind that.
+    writer.setOffset(host.clock(30.0));
+    host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
+    host.addVideoEvent(newTrack, reel4, 27.96, 29.96);
+    host.addVideoEvent(newTrack, reel4, 29.96, 31.96);
+    host.addVideoEvent(newTrack, reel4, 40.0, 42.0);
+    host.addPart(newTrack, u"part", 100.0, 200.0);
+    list.clear();
+    list.add(VideoList::Entry("/picture/reel3_v12.mov", Timecode(10.0), Timecode(0, 0, 4, 0)), false);
+
+    write();
+
+    EXPECT_EQ(written(newTrack),
+              (std::vector<Written>{
+                  {0.0, 2.0, &reel4}, {27.96, 29.96, &reel4}, {29.96, 31.96, &reel4}, {40.0, 44.0, &reel3}}));
+
+    write();
+    EXPECT_EQ(written(newTrack).size(), 4U);
+}
+
+TEST_P(VideoSourceTrackTest, WhatStartsExactlyAtTheOffsetIsReplaced)
+{
+    writer.setOffset(host.clock(30.0));
+    handler.setMode(1, Mode::NewOff);
+    host.addVideoEvent(newTrack, reel4, 29.96, 30.0);
+    host.addVideoEvent(newTrack, reel4, 30.0, 32.0);
+
+    write();
+
+    EXPECT_EQ(written(newTrack), (std::vector<Written>{{29.96, 30.0, &reel4}}));
+}
+
+TEST_P(VideoSourceTrackTest, LeavesATrackAloneThatTheUserHasLocked)
+{
+    host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
+    requireOk(query<ITrackNode>(newTrack)->setFlag(TrackFlag::Lock, true));
+    const std::string before = host.dump();
+
+    write();
+
+    EXPECT_EQ(host.dump(), before);
+}
+
+TEST_P(VideoSourceTrackTest, NeverWritesOnATrackWithoutARole)
+{
+    host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), newTrack.get())); });
+    const auto second = host.addVideoTrack(u"second");
+    host.addVideoEvent(second, reel4, 0.0, 2.0);
+    handler.rebuild(&host.adapter);
+    const std::string before = host.dump();
+
+    write();
+
+    EXPECT_EQ(host.dump(), before);
+}
+
 TEST_P(VideoSourceTrackTest, WritesTheSameWhenItWritesAgain)
 {
     write();

@@ -86,7 +86,7 @@ TEST_F(VideoTrackHandlerTest, LeavesAChannelEmptyForWhichThereIsNoTrack)
     EXPECT_EQ(names(), (Names{L"only", L""}));
     EXPECT_TRUE(handler.isAvailable(0));
     EXPECT_FALSE(handler.isAvailable(1));
-    EXPECT_EQ(modes(), (Modes{Mode::Old, Mode::None}));
+    EXPECT_EQ(modes(), (Modes{Mode::None, Mode::None}));
 
     handler.rebuild(nullptr);
     EXPECT_FALSE(handler.isAvailable(0));
@@ -100,7 +100,7 @@ TEST_F(VideoTrackHandlerTest, OfMoreThanTwoTracksThoseWithARoleAreTaken)
 
     rebuild();
     EXPECT_EQ(names(), (Names{L"rushes", L"New Video"}));
-    EXPECT_EQ(modes(), (Modes{Mode::Old, Mode::New}));
+    EXPECT_EQ(modes(), (Modes{Mode::None, Mode::New}));
 
     // Turned off it still has its role.
     host.handle(made).setRole(264);
@@ -111,6 +111,19 @@ TEST_F(VideoTrackHandlerTest, OfMoreThanTwoTracksThoseWithARoleAreTaken)
     host.addVideoTrack(u"another", TrackRole::OldVideo);
     rebuild();
     EXPECT_EQ(names(), (Names{L"New Video", L"Old Video"}));
+}
+
+TEST_F(VideoTrackHandlerTest, OfManyTracksWithARoleTheFirstOfEachPictureIsTaken)
+{
+    host.addVideoTrack(u"old", TrackRole::OldVideo);
+    host.addVideoTrack(u"older", 266);
+    host.addVideoTrack(u"oldest", TrackRole::OldVideo);
+    host.addVideoTrack(u"New Video", TrackRole::NewVideo);
+    host.addVideoTrack(u"newer", TrackRole::NewVideo);
+
+    rebuild();
+
+    EXPECT_EQ(names(), (Names{L"old", L"New Video"}));
 }
 
 TEST_F(VideoTrackHandlerTest, RefusesAChannelThatIsNotThere)
@@ -133,7 +146,7 @@ TEST_F(VideoTrackHandlerTest, ReadsTheModeFromTheRole)
     const auto first = host.addVideoTrack(u"first");
     const auto second = host.addVideoTrack(u"second");
     rebuild();
-    EXPECT_EQ(modes(), (Modes{0, 1})) << "by the order while they have no role";
+    EXPECT_EQ(modes(), (Modes{-1, -1})) << "Without a role nobody knows.";
 
     constexpr std::array<std::array<std::int32_t, 2>, 4> ModeOfRole{{{10, 0}, {8, 1}, {266, 2}, {264, 3}}};
     for (const auto& [role, mode] : ModeOfRole) {
@@ -145,9 +158,10 @@ TEST_F(VideoTrackHandlerTest, ReadsTheModeFromTheRole)
     for (const std::int32_t other : {0, 7, 9, 256}) {
         host.handle(first).setRole(other);
         host.handle(second).setRole(other);
-        EXPECT_EQ(modes(), (Modes{0, 1})) << other;
+        EXPECT_EQ(modes(), (Modes{-1, -1})) << other;
     }
 
+    host.handle(first).setRole(10);
     remove(second);
     EXPECT_EQ(modes(), (Modes{0, -1}));
 }
@@ -238,7 +252,7 @@ TEST_F(VideoTrackHandlerTest, ReportsARoleThatTheHostDoesNotTake)
     node->words = {TypeWord::Track, TypeWord::Video};
     node->setterResult = ResultFalse;
     project->children = {node};
-    Project adapter(host.context(), project.get(), nullptr);
+    Project adapter(host.context(), project.get());
     handler.rebuild(&adapter);
     listener.calls = 0;
 
@@ -287,15 +301,15 @@ TEST_F(VideoTrackHandlerTest, OfTwoTracksWithOnePictureTheFirstIsFound)
     EXPECT_FALSE(handler.trackFor(Mode::OldOff, false).isAlive());
 }
 
-TEST_F(VideoTrackHandlerTest, GoesByTheOrderOfTracksWithoutARole)
+TEST_F(VideoTrackHandlerTest, OfTracksWithoutARoleTheFirstShowsTheOldPictureAndNoneIsTheNewOne)
 {
     const auto first = host.addVideoTrack(u"first");
-    const auto second = host.addVideoTrack(u"second");
+    host.addVideoTrack(u"second");
     rebuild();
 
     for (const bool lenient : {false, true}) {
         EXPECT_EQ(handler.trackFor(Mode::Old, lenient), host.handle(first));
-        EXPECT_EQ(handler.trackFor(Mode::New, lenient), host.handle(second));
+        EXPECT_FALSE(handler.trackFor(Mode::New, lenient).isAlive());
         EXPECT_EQ(resultOf([&] { handler.trackFor(Mode::OldOff, lenient); }), Result::NotAvailable);
         EXPECT_EQ(resultOf([&] { handler.trackFor(Mode::NewOff, lenient); }), Result::NotAvailable);
         EXPECT_EQ(resultOf([&] { handler.trackFor(4, lenient); }), Result::InvalidArgument);

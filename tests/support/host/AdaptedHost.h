@@ -20,9 +20,11 @@
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <sstream>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 namespace cadrel::host::tests {
@@ -56,8 +58,11 @@ public:
     ~AdaptedHost() { disconnect(); }
 
     /// The adapter comes and goes.
-    void connect() { connectTo(&altered); }
-    void connectTo(Velmark::IHostContext* hostContext) { m_adapter = Velmark::makeCounted<Host>(hostContext); }
+    void connect(std::shared_ptr<ProjectVideo> video = nullptr) { connectTo(&altered, std::move(video)); }
+    void connectTo(Velmark::IHostContext* hostContext, std::shared_ptr<ProjectVideo> video = nullptr)
+    {
+        m_adapter = Velmark::makeCounted<Host>(hostContext, std::move(video));
+    }
     void disconnect() { m_adapter.reset(); }
     Host& adapter() { return *m_adapter; }
     core::DataModel& model() { return *m_adapter->getProjectModel(); }

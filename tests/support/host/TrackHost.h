@@ -46,7 +46,7 @@ private:
 class TrackHost : public standin::tests::TestHost {
 public:
     /// The project's clock begins at `clockOrigin`, in seconds.
-    explicit TrackHost(double clockOrigin) : origin(setClock(clockOrigin)), adapter(context(), document(), nullptr) {}
+    explicit TrackHost(double clockOrigin) : origin(setClock(clockOrigin)), adapter(context(), document()) {}
 
     Track handle(const Node& track) { return Track(&adapter, Velmark::query<Velmark::ITrackNode>(track).get()); }
 

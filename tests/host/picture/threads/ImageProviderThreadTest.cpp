@@ -74,8 +74,29 @@ TEST(ImageProviderThread, HasTheNameByWhichADebuggerShowsIt)
     Drawing drawing;
 
     EXPECT_EQ(drawing.thread->getThreadName(), juce::String("ThumbnailProvider"));
-    EXPECT_TRUE(drawing.thread->isThreadRunning());
+}
+
+TEST(ImageProviderThread, StartsAtItsFirstRequest)
+{
+    Drawing drawing;
     EXPECT_TRUE(drawing.thread->canDraw());
+    EXPECT_FALSE(drawing.fetch());
+    EXPECT_FALSE(drawing.thread->isThreadRunning());
+
+    EXPECT_TRUE(drawing.request(1));
+
+    EXPECT_TRUE(drawing.thread->isThreadRunning());
+    EXPECT_TRUE(drawing.fetchInTime().success);
+    EXPECT_TRUE(drawing.draw(2).success);
+}
+
+TEST(ImageProviderThread, CanBeStoppedThoughItNeverStarted)
+{
+    Drawing drawing;
+
+    drawing.stop();
+
+    EXPECT_EQ(drawing.thumbnails.factoriesAlive, 0);
 }
 
 TEST(ImageProviderThread, LetsTheHostDrawTheFrameOfTheClipAtTheSize)
@@ -244,26 +265,25 @@ TEST(ImageProviderThread, AsksTheHostForItsThumbnailFactory)
     EXPECT_TRUE(thread.stop());
 }
 
-TEST(ImageProviderThread, RunsWithoutAFactoryButCanNotDraw)
+TEST(ImageProviderThread, CanNotDrawWithoutAFactory)
 {
-    const auto runsButCanNotDraw = [](IHostContext* context) {
+    const auto canNotDraw = [](IHostContext* context) {
         ImageProviderThread thread(context);
-        EXPECT_TRUE(thread.isThreadRunning());
         EXPECT_FALSE(thread.canDraw());
         EXPECT_TRUE(thread.stop());
     };
 
     tests::AlteredContext emptyHost(nullptr);
-    runsButCanNotDraw(&emptyHost);
+    canNotDraw(&emptyHost);
 
     tests::ThumbnailHost withoutThumbnails;
     withoutThumbnails.objectFactory->create = [](const char*, const char*) { return nullptr; };
-    runsButCanNotDraw(&withoutThumbnails.context);
+    canNotDraw(&withoutThumbnails.context);
     EXPECT_EQ(withoutThumbnails.objectFactory->givenBack, 0);
 
     tests::ThumbnailHost withSomethingElse;
     withSomethingElse.objectFactory->create = [](const char*, const char*) -> FObject* { return new tests::FakeClip; };
-    runsButCanNotDraw(&withSomethingElse.context);
+    canNotDraw(&withSomethingElse.context);
     EXPECT_EQ(withSomethingElse.objectFactory->givenBack, 1);
 }
 

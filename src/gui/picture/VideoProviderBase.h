@@ -17,9 +17,9 @@ namespace cadrel::gui {
 
 class VideoTrackHandlerBase;
 
-/// Two pictures side by side, one of the old version and one of the new: it keeps which times are wanted and the last
-/// pictures that came, and leaves to the derived class where they come from. The operations with a side throw
-/// Result::InvalidArgument for one that is neither OldSide nor NewSide.
+/// Two pictures side by side, one of the old version and one of the new. It keeps the wanted times and the last
+/// pictures; a derived class provides the pictures. The operations with a side throw Result::InvalidArgument for one
+/// that is neither OldSide nor NewSide.
 class VideoProviderBase {
 public:
     static constexpr std::size_t OldSide = 0;
@@ -43,7 +43,7 @@ public:
     void setTime(std::size_t side, const core::Timecode& timecode);
     /// Whether the pictures asked for from now on are the last ones before an OUT point.
     void setLastFrame(bool flag) { m_lastFrame = flag; }
-    /// Of the size that was set until the first picture comes; those that come may have another.
+    /// The last picture. Until the first one comes, it has the size that was set; later ones may have another size.
     const juce::Image& getImage(std::size_t side) const;
     /// In pixels; asks for both pictures again when it is another size. Throws Result::OutOfRange below 1.
     void setImageSize(int width, int height);

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "gui/video/VideoProviderBase.h"
+#include "gui/picture/VideoProviderBase.h"
 
 #include "core/time/Timecode.h"
 #include "tests/support/core/TestProject.h"
