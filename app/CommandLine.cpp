@@ -43,8 +43,8 @@ Examples:
       --heal gaps --vfx 'VFX_****_v,_comp' -o change.edl --json change.json)";
 
 constexpr const char* ApplyHelp =
-    R"(Clips, automation and markers go where their picture has gone. What stood in no shot that survives goes out of the
-project, and a new shot has no sound yet. Locked tracks stay as they are. On tracks of its own in the folder "Cadrel
+    R"(Clips, automation and markers go where their picture went. Sound whose picture is gone is removed from the project,
+and a new shot has no sound yet. Locked tracks stay as they are. On tracks of its own in the folder "Cadrel
 Markers", Cadrel marks where to look: each stretch that was carried over (Destination), new picture (Insert), new
 transitions (Dissolve/Wipe), jumps of the automation where two stretches meet (Automation Warning), slivers of clips
 at the end of one (Audio Snippet), and stretches that want the same place of a track (Overlap).
@@ -72,7 +72,7 @@ Examples:
 constexpr const char* ShowHelp =
     R"(Shows the facts of the project and the tree of its tracks; then what lies on each track, with its times, its clip
 and how far into the clip it begins, and the points of its automation, of long curves the first and the last; then
-the media pool. Times are those of the project's clock; .25 behind a timecode is a quarter of a frame. With --json -
+the media pool. Times are those of the project's clock; .25 after a timecode is a quarter of a frame. With --json -
 only the JSON goes to standard output, with all points and with times in seconds, too.
 
 Examples:

@@ -32,7 +32,7 @@ public:
     const std::vector<Velmark::Counted<Project>>& projects() const { return m_projects; }
     /// Null when none is.
     Project* active() const { return m_active; }
-    /// The open project behind an interface; null for any other.
+    /// The open project that has this interface; null for any other.
     Project* find(const Velmark::IProjectDocument* project) const;
 
     // These tell the listeners, from a copy of their list.

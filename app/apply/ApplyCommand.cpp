@@ -96,7 +96,7 @@ void configure(Settings& settings, const ApplyOptions& options)
     const double before = secondsOf(options.preserve[0]);
     const double after = secondsOf(options.preserve[1]);
     if (!(before < after))
-        throw UsageError{"--preserve: the second timecode has to lie behind the first"};
+        throw UsageError{"--preserve: the second timecode has to be after the first"};
     settings.setRestrictRange(true);
     settings.setPreserveMaterial(before, after);
 }

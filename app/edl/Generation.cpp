@@ -29,14 +29,14 @@ VfxPatternEntry vfxPatternOf(const std::string& text)
 {
     const std::size_t comma = text.find(',');
     if (comma == std::string::npos)
-        throw UsageError{"--vfx: \"" + text + "\" has no comma between the texts before and behind the version number"};
+        throw UsageError{"--vfx: \"" + text + "\" has no comma between the texts before and after the version number"};
     const std::string prefix = text.substr(0, comma);
     const std::string postfix = text.substr(comma + 1);
     try {
         VfxNameMatcher().compile({{prefix, postfix}});
     } catch (const Result::Type&) {
         throw UsageError{prefix.empty() && postfix.empty()
-                             ? "--vfx: give a text before or behind the comma"
+                             ? "--vfx: give a text before or after the comma"
                              : "--vfx: \"" + text + "\" may hold letters, digits and . * - _ alone"};
     }
     return {prefix, postfix, true};

@@ -218,7 +218,7 @@ private:
         }
     }
 
-    /// What is laid on one track one behind the other must not overlap.
+    /// Clips that follow one another on a track must not overlap.
     static void checkOrder(const Track& track)
     {
         for (const Node* node = track.firstChild(); node; node = track.childBehind(*node)) {

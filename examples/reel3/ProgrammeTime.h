@@ -22,7 +22,7 @@ inline constexpr double toSeconds(Quarters quarters)
 }
 
 /// Reads "HH:MM:SS:FF" and every shorter form of it, such as "SS:FF", with an optional ".25", ".50" or ".75" of a frame
-/// behind it. Throws std::invalid_argument.
+/// after it. Throws std::invalid_argument.
 Quarters parseQuarters(const std::string& text);
 
 /// The same, from the start of the reel, which is 03:00:00:00.

@@ -6,8 +6,8 @@
 
 namespace reel3 {
 
-/// A recording laid by hand. Times are "HH:MM:SS:FF" of the programme and lengths "SS:FF", each with an optional ".25" for a
-/// quarter of a frame behind it, at 24 frames a second.
+/// A recording laid by hand. Times are "HH:MM:SS:FF" of the programme and lengths "SS:FF", each with an optional ".25"
+/// after it for a quarter of a frame, at 24 frames a second.
 struct Cue {
     const char* in;
     const char* length;

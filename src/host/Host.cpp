@@ -132,7 +132,7 @@ int32 Host::projectDeactivated(IProjectDocument* /*project*/)
 
 void Host::setCurrentProject(Project* project)
 {
-    // Nothing is left behind half: the window follows whatever fails.
+    // Everything is carried out, so that the window follows even if something fails.
     FirstFailure failure;
     std::vector<std::int32_t> dropped;
     if (m_currentProject != project) {

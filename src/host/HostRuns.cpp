@@ -168,7 +168,7 @@ Result::Type Host::runCadrel()
             project.createMarkerTracks(transaction);
             const Result::Type ran = run(changeList);
             if (ran == Result::Cancelled) {
-                // Where it can't be undone it stays, and mustn't look done.
+                // If the run can't be undone, it stays, and must not look complete.
                 actions = required(service<IActionManager>(m_context));
                 return;
             }
@@ -274,7 +274,7 @@ Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTra
             if (previewed.events() != previewedBefore)
                 requireOk(m_transaction->addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get()));
         });
-        // No memo is carried over rather than to the wrong place.
+        // Otherwise a memo might be carried over to the wrong place.
         if (kept != Result::Ok)
             previewed.clear();
         if (result == Result::Ok)
@@ -346,7 +346,7 @@ void Host::setPreviewActive(bool active)
         failure.ofStep([&] { project.setTracksLocked(false); });
         project.releaseLockTracks();
     } else {
-        // What is kept is how it stood before the preview moved it.
+        // The stored cycle is the one from before the preview moved it.
         if (!wasActive)
             failure.ofStep([&] { keepCycles(); });
         failure.ofStep([&] { ensurePreviewOffset(project); });
@@ -360,7 +360,7 @@ void Host::keepCycles()
 {
     using Key = core::PropertyKey;
     core::DataModel& model = m_currentProject->model();
-    // What can't be read isn't restored, least of all as it was before an earlier preview.
+    // A value that can't be read isn't restored. The one from before an earlier preview would be wrong.
     for (const std::int32_t key : {Key::ProjectCycleLeft, Key::ProjectCycleRight, Key::TransportCycleLower,
                                    Key::TransportCycleUpper, Key::TransportPosition})
         model.removeProperty(key);

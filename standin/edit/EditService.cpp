@@ -207,7 +207,7 @@ std::vector<Counted<Project>> EditService::editedProjects(Project& committed) co
 {
     std::vector<Counted<Project>> projects;
     for (const ChangeLog::Record& record : m_log.records()) {
-        // A project that was closed meanwhile may have gone: it isn't looked into.
+        // A project that was closed meanwhile may have been deleted, so it isn't accessed.
         Project* const project = m_projects.find(record.project ? record.project : &committed);
         if (project && std::find(projects.begin(), projects.end(), project) == projects.end())
             projects.push_back(Counted<Project>::share(project));

@@ -56,7 +56,7 @@ struct PointsAround {
     CurvePoints atStart;
     CurvePoints within;
     CurvePoints atEnd;
-    Counted<AutomationPoint> behind; ///< the nearest behind it
+    Counted<AutomationPoint> behind; ///< the nearest after it
 };
 
 PointsAround pointsAround(const Envelope& curve, double start, double end)

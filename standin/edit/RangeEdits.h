@@ -20,15 +20,15 @@ class RangeContent : public Velmark::Implements<RangeContent, Velmark::FObject> 
 public:
     static constexpr const char* ClassName = "RangeContent";
 
-    /// Clips, range markers and parts are cut at the edges; a point marker at `end` stays behind.
+    /// Clips, range markers and parts are cut at the edges; a point marker at `end` isn't copied.
     RangeContent(const Project& project, const std::vector<Track*>& tracks, double start, double end);
 
     /// In seconds.
     double length() const { return m_length; }
     /// Whether it was read from that project.
     bool isOf(const Project& project) const;
-    /// Clears the range of the same length at `destination` on the tracks and writes the content there. What would fall
-    /// below time 0 is dropped. Tracks that are in no project any more are passed over.
+    /// Clears the range of the same length at `destination` on the tracks and writes the content there. What would be
+    /// below time 0 is dropped. Tracks that are no longer in a project are skipped.
     void writeAt(double destination) const;
 
 private:

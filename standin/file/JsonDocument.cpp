@@ -277,7 +277,7 @@ void JsonValue::appendTo(std::string& json) const
     case Kind::Number: {
         std::string digits;
         appendJsonNumber(digits, item().number);
-        // It is no integer, even if there is nothing behind the point.
+        // It is not an integer, even if nothing comes after the point.
         json += digits.find_first_of(".e") == std::string::npos ? digits + ".0" : digits;
         break;
     }

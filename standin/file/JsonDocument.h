@@ -14,8 +14,9 @@ namespace standin {
 
 class JsonValue;
 
-/// A JSON text that has been read (RFC 8259). All its values lie one behind the other in one list, each container before
-/// what it holds, so that even a large text costs little more than its own size, and no depth can exhaust the stack.
+/// A JSON text that has been read (RFC 8259). All its values are in one list, one after the other, each container
+/// before what it holds, so that even a large text costs little more than its own size, and no depth can exhaust the
+/// stack.
 class JsonDocument {
 public:
     /// No text is larger than this, in bytes.
@@ -41,7 +42,7 @@ private:
     struct Item {
         Kind kind;
         std::uint32_t key; ///< of a member of an object: the index of its key
-        std::uint32_t end; ///< the index of the item behind this one and all that it holds
+        std::uint32_t end; ///< the index of the item after this one and all that it holds
         union {
             bool boolean;
             std::int64_t integer;

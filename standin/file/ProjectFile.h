@@ -31,8 +31,8 @@ public:
     static Velmark::Counted<Project> read(const std::filesystem::path& file, ChangeLog& log);
     /// The same from the content of a file; `name` is for the errors alone.
     static Velmark::Counted<Project> parse(std::string_view text, const std::string& name, ChangeLog& log);
-    /// Replaces the file at one stroke: whatever happens, there is all of the former or all of the new one. Throws
-    /// ProjectFileError.
+    /// Replaces the file in one step: whatever happens, there is either the whole former file or the whole new one.
+    /// Throws ProjectFileError.
     static void write(const Project& project, const std::filesystem::path& file);
     /// The content of the file. Throws ProjectFileError, without a name, for a project that no file can hold.
     static std::string toText(const Project& project);

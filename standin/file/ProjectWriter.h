@@ -46,7 +46,7 @@ private:
     void writeReference(const MediaClip& clip);
 
     void writeName(const Node& node);
-    /// What any node may have behind what it is: selection, attributes and unknown members.
+    /// What any node may have after its own members: selection, attributes and unknown members.
     void writeDetails(const Node& node, KnownKeys known, JsonWriter::Layout layout);
     void writeAttributes(const Node& node, JsonWriter::Layout layout);
     void writeAttribute(const Attribute& attribute, JsonWriter::Layout layout);

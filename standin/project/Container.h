@@ -24,7 +24,7 @@ public:
     virtual bool accepts(const Node& child) const = 0;
 
     std::size_t childCount() const { return m_children.size(); }
-    /// Null for an empty container, and behind the last child.
+    /// Null for an empty container, and after the last child.
     Node* firstChild() const;
     Node* lastChild() const;
     Node* childBehind(const Node& child) const;

@@ -50,7 +50,8 @@ protected:
     /// Whether the source runs on from the end of this one into `next`, which is of the same class and was a piece of the
     /// same event.
     virtual bool sourceRunsOn(const Event& next) const = 0;
-    /// Takes the content of a piece that begins `offset` seconds behind the own start; called before `next` is removed.
+    /// Takes the content of a piece that begins `offset` seconds after this event's start; called before `next` is
+    /// removed.
     virtual void takeContent(Event& next, double offset);
 
 private:

@@ -83,8 +83,8 @@ public:
     double absoluteEnd() const;
     /// `end` must not lie before `start`, and both must be finite.
     void setSpan(double start, double end);
-    /// Takes the node out of its container, if it is in one, and puts it into another behind all that start with it.
-    /// The container must accept it.
+    /// Takes the node out of its container, if it is in one, and puts it into another, after all that start at the same
+    /// time. The container must accept it.
     void insertInto(Container& parent);
     /// Takes `former` out of its container, in which it must be, and goes into it instead. Of two that start together it is
     /// in the same place among all that do.

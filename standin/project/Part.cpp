@@ -32,7 +32,7 @@ bool Part::accepts(const Node& child) const
 Counted<Event> Part::makePiece(double offset, double length) const
 {
     auto piece = makeCounted<Part>();
-    // What a part holds behind its end is heard again when that is moved, so the last piece has all of it.
+    // When the end of a part is moved, what is after it is heard again. So the last piece keeps all of it.
     const bool isLast = offset + length > this->length() - SameInstant;
     const double end = isLast ? std::numeric_limits<double>::infinity() : offset + length;
     visitTouching(offset - SameInstant, end, [&](const Node& child) {

@@ -20,7 +20,7 @@ class Track;
 
 /// A project: the root of the tracks, the media pool and the clock, and what the user sees of them.
 ///
-/// It notes which of its objects have changed, and keeps them alive, until all have been told.
+/// It notes which of its objects have changed, and keeps them alive until all listeners have been called.
 class Project : public Velmark::Implements<Project, Container, Velmark::IProjectDocument, Velmark::ITimeBase> {
 public:
     static constexpr const char* ClassName = "Project";

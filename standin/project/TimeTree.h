@@ -40,7 +40,7 @@ public:
     void insert(TimeSpan& span);
     void erase(TimeSpan& span);
 
-    /// Null behind the last, or for an empty tree.
+    /// Null after the last, or for an empty tree.
     TimeSpan* first() const;
     TimeSpan* last() const;
     static TimeSpan* next(const TimeSpan& span);

@@ -8,8 +8,8 @@
 
 namespace standin {
 
-/// Alerts as messages on the terminal. Nobody is asked: the default button, which is the first that there is, counts as
-/// used, and its label stands behind the message.
+/// Alerts as messages on the terminal. Nobody is asked: the first button is the default and counts as used, and its
+/// label comes after the message.
 class AlertService : public Velmark::Implements<AlertService, Velmark::FObject, Velmark::IAlertService> {
 public:
     static constexpr const char* ClassName = "AlertService";

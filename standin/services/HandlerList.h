@@ -9,7 +9,7 @@
 
 namespace standin {
 
-/// Those who have registered for something: each once, in the order in which they came, and none of them counted.
+/// Registered handlers: each once, in the order in which they were added, and none of them counted.
 template <class Handler>
 class HandlerList {
 public:

@@ -8,15 +8,14 @@
 
 namespace standin {
 
-/// Where a host without windows speaks to its user: messages, a line each, and where lines can be redrawn one line
-/// below them that tells how the work goes and gives way to whatever comes next. What could control the terminal is
-/// shown as "?".
+/// Where a host without windows speaks to its user: messages, a line each. If lines can be redrawn, there is a progress
+/// line below them, which the next message replaces. What could control the terminal is shown as "?".
 class Terminal {
 public:
     /// What the progress line is cut to, in characters, so that it doesn't wrap.
     static constexpr std::size_t LineLength = 79;
 
-    /// Nobody listens and nobody interrupts.
+    /// Shows nothing and is never interrupted.
     Terminal() = default;
     /// `canRedraw` says that the stream is a terminal. `interrupted`, which may be null, is nonzero from when the user
     /// wants to stop what goes on; the program's signal handler sets it. Both have to outlive the terminal.

@@ -7,7 +7,7 @@
 
 namespace standin {
 
-/// This host has no windows: it knows no skin, and no window by name.
+/// This host has no windows, so it refuses every skin and every name of a window.
 class ViewManager : public Velmark::Implements<ViewManager, Velmark::FObject, Velmark::IViewManager> {
 public:
     static constexpr const char* ClassName = "ViewManager";

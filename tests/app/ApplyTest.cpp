@@ -650,7 +650,7 @@ TEST(Apply, APreservedStretchHasToBeOne)
         return outcome.err;
     };
 
-    EXPECT_TRUE(tells(refusal("01:00:20:00", "01:00:10:00"), "the second timecode has to lie behind the first"));
+    EXPECT_TRUE(tells(refusal("01:00:20:00", "01:00:10:00"), "the second timecode has to be after the first"));
     EXPECT_TRUE(tells(refusal("01:00:10:24", "01:00:20:00"), "\"01:00:10:24\" is no timecode of the project"));
     EXPECT_TRUE(tells(refusal("10", "20"), "\"10\" is no timecode of the project"));
     EXPECT_EQ(scene.apply({"--preserve", "-00:00:10:00", "01:00:20:00"}).status, 0);

@@ -38,7 +38,7 @@ inline void requireOk(Velmark::int32 result)
         throw util::Result::HostCallFailed;
 }
 
-/// Throws a result of the system's own that is none of success.
+/// Throws `result` unless it is Ok.
 inline void requireSuccess(util::Result::Type result)
 {
     if (result != util::Result::Ok)

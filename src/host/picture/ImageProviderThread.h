@@ -19,8 +19,8 @@ class IHostContext;
 
 namespace cadrel::host {
 
-/// Lets the host draw pictures on a thread of its own, one at a time; the first request starts it. A request goes round between the two threads, and who
-/// has it alone may touch what belongs to it:
+/// Lets the host draw pictures on a thread of its own, one at a time; the first request starts it. A request goes back and
+/// forth between the two threads. Only the thread that has it may use its data:
 ///
 ///          request            render             fetch
 ///     Free -------> Requested -------> Finished -------> Free

@@ -37,7 +37,7 @@ void SingleImageProvider::poll()
 {
     juce::Image image;
     bool success = false;
-    // What comes late for a newer request would be a wrong picture.
+    // A picture that comes after a newer request is the wrong one.
     if (m_thread->fetch(image, success) && m_isAwaited && !m_dirty) {
         if (success)
             m_provider.deliverImage(image, m_side);

@@ -7,7 +7,7 @@
 
 namespace cadrel::host {
 
-/// While it lives, timecodes have the rate of a project; behind it that of whoever gave it before.
+/// While it lives, timecodes have the rate of a project. Afterwards they have the earlier rate again.
 class FramerateScope {
 public:
     explicit FramerateScope(const core::FramerateProvider& provider) : m_former(core::Timecode::framerateProvider())

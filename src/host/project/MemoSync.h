@@ -74,8 +74,8 @@ private:
         Stretch stretch;
         std::vector<HostEvent> copies;
     };
-    /// Each memo behind the preview offset belongs to the first stretch in which most of it lies or, where there is none, to
-    /// the first into which it reaches.
+    /// Each memo after the preview offset belongs to the first stretch in which most of it lies or, where there is
+    /// none, to the first into which it reaches.
     struct Preview {
         std::vector<Shown> shown;      ///< in the order of the events
         std::vector<HostEvent> adrift; ///< in no stretch

@@ -33,7 +33,7 @@ void gatherTracks(IProjectNode& parent, std::vector<Counted<ITrackNode>>& tracks
             tracks.push_back(std::move(track));
             gatherTracks(*child, tracks);
         } else if (child->isType(TypeWord::Track)) {
-            // Left out, it would be the one that doesn't fit a film that looks done.
+            // Without this track, a run would seem complete although the track still fits the old cut.
             throw Result::HostObjectMissing;
         }
     }

@@ -46,7 +46,7 @@ bool precedes(const SecondsRange& a, const SecondsRange& b)
     return isBefore(a.start, b.start) || (!isBefore(b.start, a.start) && isBefore(a.end, b.end));
 }
 
-/// Cuts that stand no further apart meet, in seconds.
+/// Cuts that are no further apart than this touch, in seconds.
 constexpr double ShortestGap = 0.01;
 
 bool isLongEnough(const SecondsRange& gap)
@@ -81,7 +81,7 @@ struct GapTrack {
     std::vector<SecondsRange> done;
 };
 
-/// Adds a stretch to ranges that ascend and stand apart, and answers the pieces of it that none of them covered.
+/// Adds a stretch to ranges that are in order and don't touch, and returns the pieces of it that none of them covered.
 std::vector<SecondsRange> cover(std::vector<SecondsRange>& ranges, const SecondsRange& stretch)
 {
     const auto first = std::ranges::partition_point(
@@ -126,7 +126,7 @@ std::string hostText(std::string text)
     return text;
 }
 
-/// The blank behind a reel is deliberate.
+/// The blank after a reel is deliberate.
 std::wstring destinationName(const core::EventBase& event, const core::Settings& settings)
 {
     const std::string name = settings.matchBy() == core::MatchBy::ClipName ? event.clipName() : event.rollName() + " ";
@@ -259,7 +259,7 @@ void Project::completeApply(IEditTransaction& transaction)
 }
 
 //     before    real |== old ==|           preview |== new ==|
-//     behind    real |== new ==|           preview
+//     after     real |== new ==|           preview
 void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end)
 {
     const double offset = requiredOffset();
@@ -268,7 +268,7 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
         track.removeRange(transaction, start, end);
         tick(1);
     }
-    // What stands before the stretch is the real programme's own, and an edge there would leave points behind.
+    // What is before the stretch belongs to the real programme, and an edge there would leave automation points in it.
     const double written = std::max(start, 0.0);
     if (!isBefore(written, end))
         return;
@@ -303,7 +303,7 @@ void Project::closeRange(bool onlySelected, double start, double end)
     const int32 result =
         required(service<IEditService>(m_hostContext))
             ->closeRange(m_document, listOf(pointersTo(tracks)).get(), start - origin, end - origin, 0.0);
-    // Nothing to join is no failure.
+    // It is no failure if there is nothing to join.
     if (result != ResultFalse)
         requireOk(result);
 }

@@ -58,7 +58,8 @@ void Project::load()
     FirstFailure failure;
     failure.ofStep([this] { readModel(); });
     if (!m_model.isPreviewActive()) {
-        // There is nothing left that the user could switch off. What can't be unlocked here, the next run unlocks.
+        // There is no preview that the user could switch off. If a track can't be unlocked here, the next run unlocks
+        // it.
         for (Track& track : m_lockedTracks)
             resultOf([&] { track.setLock(false); });
         std::erase_if(m_lockedTracks, [](const Track& track) { return !track.hasLockState(); });
@@ -94,7 +95,7 @@ void Project::save()
     requireOk(list->setBinary(AttributeKey::StorageData, block.data(), static_cast<int32>(block.size()), true));
     requireOk(project->setAttribute(AttributeKey::Storage, FVariant::object(list.get()), true));
     const int32 result = project->setAttribute(AttributeKey::StorageChecksum, FVariant::integer(block.crc32()), true);
-    // A block without a checksum would be taken for a broken one.
+    // A block without a checksum would count as damaged.
     if (result != ResultOk)
         project->removeAttribute(AttributeKey::Storage);
     requireOk(result);

@@ -26,7 +26,7 @@ void Project::createMarkerTracks(IEditTransaction& transaction)
         if (track.isOn(m_model.settings()))
             findOrCreateMarkerTrack(transaction, track.role);
     }
-    // By these the copies in a preview are known again. What is copied keeps its id, so several memos may have the same.
+    // The ids identify the copies in a preview. A copy keeps its id, so several memos may have the same one.
     if (hasPreviewOffset())
         markerTrack(TrackRole::Memos).assignOwnIds(0.0, previewOffset() - timeOrigin());
 }
@@ -121,7 +121,7 @@ void Project::findOrCreateMarkerTrack(IEditTransaction& transaction, std::int32_
     const auto folder = required(query<IProjectNode>(m_folderTrack.node()));
     Track& slot = markerTrack(role);
     if (!findTrack(slot, TypeWord::Marker, role)) {
-        // The host may have one ready that nobody uses yet.
+        // The host may have a marker track that isn't used yet.
         const auto unused = query<IProjectNode>(m_document->getDefaultMarkerTrack());
         Track created = unused && !unused->getParent() ? Track(this, required(query<ITrackNode>(unused)).get())
                                                        : createTrack(TypeWord::Marker);

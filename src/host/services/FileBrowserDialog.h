@@ -19,9 +19,9 @@ public:
 
     explicit FileBrowserDialog(Velmark::IHostContext* context) : m_context(context) {}
 
-    /// A folder that the host can't take is passed over: the box then opens where the host likes. Throws
-    /// Result::NotAvailable when the host has no file boxes or its box fails, and what HostFailure.h tells when a chosen
-    /// path can't be had; `results` stays as it was.
+    /// If the host can't use the folder, the box opens in a folder of the host's choice. Throws Result::NotAvailable
+    /// when the host has no file boxes or its box fails, and what HostFailure.h tells when a chosen path can't be had;
+    /// `results` stays as it was.
     void browse(const std::wstring& title, const std::wstring& startFolder, const std::wstring& extension,
                 const std::wstring& description, bool saveMode, std::vector<std::string>& results) override;
 

@@ -16,9 +16,9 @@ namespace cadrel::host {
 ///
 ///     Processing Project - Generate Markers
 ///
-/// All texts come in the user's language already. Every operation but `isCancelled` throws Result::NotAvailable when there
-/// is no window. What the host refuses while the window is there is passed over: a run doesn't break off for a line of
-/// display.
+/// All texts come in the user's language already. Every operation but `isCancelled` throws Result::NotAvailable when
+/// there is no window. A failure of the host while the window is open is ignored: a run doesn't stop because its
+/// progress can't be shown.
 class ProgressHandler : public core::ProgressHandlerBase {
 public:
     /// The context isn't owned.

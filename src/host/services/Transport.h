@@ -17,7 +17,7 @@ public:
     explicit Transport(Velmark::Counted<Velmark::ITransportControl> control) : m_control(std::move(control)) {}
 
     void getCycle(double& left, double& right) const;
-    /// Throws Result::InvalidArgument for a left bound behind the right one; nothing is set then.
+    /// Throws Result::InvalidArgument for a left bound after the right one; nothing is set then.
     void setCycle(double left, double right) const;
     double position() const;
     void setPosition(double seconds) const;

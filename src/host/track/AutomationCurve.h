@@ -28,7 +28,7 @@ public:
     /// What it automates.
     std::int32_t number() const { return m_number; }
 
-    /// The points on both sides of a time; behind the last one the curve is held at its value.
+    /// The points on both sides of a time; after the last one the curve keeps its value.
     core::AutomationState stateAt(double time) const;
 
     /// Lets the curve run straight from what it has come to at `start` to what it goes on with at `end`: a new point at

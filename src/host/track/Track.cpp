@@ -35,7 +35,7 @@ constexpr double HalfFrame = 0.02;
 /// The kinds of tracks whose events eventAt and clipEvents know.
 constexpr std::array EventKinds{TypeWord::Audio, TypeWord::Marker, TypeWord::Video};
 
-/// More than half of an event lies in a part of it, and not by a hair.
+/// Whether `part` is the larger part of an event and `rest` the smaller one, by more than the rounding of times.
 bool isMostOf(double part, double rest)
 {
     return isBefore(rest, part);

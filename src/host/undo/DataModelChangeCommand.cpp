@@ -31,7 +31,7 @@ DataModelChangeCommand::DataModelChangeCommand(std::wstring name, IEditTransacti
       m_transaction(Velmark::Counted<IEditTransaction>::share(&transaction)), m_model(&model), m_project(project),
       m_step(Velmark::makeCounted<DataModelEditStep>(*m_model, std::move(before))), m_commitOnEnd(commitOnEnd)
 {
-    // Behind all else that can fail, so that no transaction is left open.
+    // This comes after everything else that can fail, so that no transaction is left open.
     if (m_commitOnEnd)
         requireOk(m_transaction->begin(true));
 }

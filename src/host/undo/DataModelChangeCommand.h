@@ -15,8 +15,9 @@ class IProjectDocument;
 
 namespace cadrel::host {
 
-/// Brings one change of the model into the host's undo list: it holds the state from before the change from its making on,
-/// and hands it to the transaction at its end. What the host refuses there is passed over, since nothing may be thrown.
+/// Brings one change of the model into the host's undo list: it takes a snapshot of the state before the change when it
+/// is created, and gives it to the transaction when it is destroyed. It ignores a failure of the host there, because a
+/// destructor must not throw.
 class DataModelChangeCommand : public core::DataModelChangeCommand {
 public:
     /// A change that is an entry of the undo list by itself: begins the transaction, and commits it under the name at the

@@ -16,7 +16,7 @@ namespace cadrel::core {
 
 class DataModel;
 
-/// What stands behind the handle: the host's transaction, borrowed.
+/// What the handle stands for: the host's transaction, borrowed.
 class EditTransactionHandle {
 public:
     explicit EditTransactionHandle(Velmark::IEditTransaction& transaction) : m_transaction(transaction) {}

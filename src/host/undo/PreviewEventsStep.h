@@ -12,8 +12,8 @@
 
 namespace cadrel::host {
 
-/// Lets a project's list of previewed events follow the host's undo list, as what stands in the preview stretch does. Were
-/// the two apart, the next edit of a memo would be carried over to the wrong place.
+/// Lets a project's list of previewed events follow the host's undo list, as what stands in the preview stretch does.
+/// If the two differed, the next edit of a memo would be carried over to the wrong place.
 class PreviewEventsStep : public Velmark::Implements<PreviewEventsStep, Velmark::FObject, Velmark::IEditStep> {
 public:
     static constexpr const char* ClassName = "PreviewEventsStep";
