@@ -3,7 +3,7 @@
 #include "app/project/ProjectContent.h"
 
 #include "app/Printable.h"
-#include "standin/file/Utf16.h"
+#include "standin/base/Utf16.h"
 
 #include <algorithm>
 #include <string_view>

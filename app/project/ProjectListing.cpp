@@ -4,8 +4,8 @@
 
 #include "app/Printable.h"
 #include "app/Wording.h"
-#include "standin/file/Utf16.h"
-#include "standin/project/AttributeList.h"
+#include "standin/base/AttributeList.h"
+#include "standin/base/Utf16.h"
 
 #include <algorithm>
 #include <array>

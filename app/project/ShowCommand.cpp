@@ -14,8 +14,8 @@
 #include "app/project/ProjectContent.h"
 #include "app/project/ProjectJson.h"
 #include "app/project/ProjectListing.h"
+#include "standin/base/Utf16.h"
 #include "standin/file/ProjectFile.h"
-#include "standin/file/Utf16.h"
 #include "standin/project/Project.h"
 
 #include <algorithm>

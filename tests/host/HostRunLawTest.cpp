@@ -10,7 +10,7 @@
 #include "host/Host.h"
 #include "host/track/TrackRole.h"
 #include "standin/Application.h"
-#include "standin/ProjectManager.h"
+#include "standin/edit/ProjectManager.h"
 #include "standin/edit/EditService.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"

@@ -4,7 +4,7 @@
 
 #include "host/border/HostFailure.h"
 #include "host/undo/DataModelEditStep.h"
-#include "standin/project/AttributeList.h"
+#include "standin/base/AttributeList.h"
 #include "tests/core/TestProject.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/core/edl/EventMaking.h"

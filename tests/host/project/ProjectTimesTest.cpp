@@ -4,7 +4,7 @@
 
 #include "core/notify/ChangeContext.h"
 #include "host/border/HostFailure.h"
-#include "standin/project/Parameter.h"
+#include "standin/base/Parameter.h"
 #include "tests/core/TestProject.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/core/edl/EventMaking.h"

@@ -3,9 +3,9 @@
 #include "host/services/FileBrowserDialog.h"
 
 #include "standin/Application.h"
-#include "standin/services/FilePath.h"
+#include "standin/base/FilePath.h"
 #include "standin/services/FileSelector.h"
-#include "standin/services/ObjectList.h"
+#include "standin/base/ObjectList.h"
 #include "tests/core/ThrownResult.h"
 #include "tests/host/AlteredContext.h"
 #include "tests/util/PlainConverter.h"
