@@ -2,7 +2,7 @@
 
 #include "app/project/ProjectContent.h"
 
-#include "app/Printable.h"
+#include "app/console/Printable.h"
 #include "standin/base/Utf16.h"
 
 #include <algorithm>

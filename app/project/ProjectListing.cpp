@@ -2,8 +2,8 @@
 
 #include "app/project/ProjectListing.h"
 
-#include "app/Printable.h"
-#include "app/Wording.h"
+#include "app/console/Printable.h"
+#include "app/console/Wording.h"
 #include "standin/base/AttributeList.h"
 #include "standin/base/Utf16.h"
 

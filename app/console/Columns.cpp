@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/Columns.h"
+#include "app/console/Columns.h"
 
 #include <algorithm>
 #include <string_view>

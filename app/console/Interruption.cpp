@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/Interruption.h"
+#include "app/console/Interruption.h"
 
 namespace cadrel::app {
 

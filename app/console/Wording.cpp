@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/Wording.h"
+#include "app/console/Wording.h"
 
 namespace cadrel::app {
 

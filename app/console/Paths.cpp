@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/Paths.h"
+#include "app/console/Paths.h"
 
-#include "app/Printable.h"
+#include "app/console/Printable.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/JsonOutput.h"
+#include "app/console/JsonOutput.h"
 
-#include "app/Failure.h"
-#include "app/Interruption.h"
-#include "app/Paths.h"
+#include "app/console/Failure.h"
+#include "app/console/Interruption.h"
+#include "app/console/Paths.h"
 #include "util/FilePath.h"
 #include "util/Result.h"
 

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/Printable.h"
+#include "app/console/Printable.h"
 
 #include "util/PrintableCharacter.h"
 

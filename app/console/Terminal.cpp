@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/Terminal.h"
+#include "app/console/Terminal.h"
 
-#include "app/Printable.h"
+#include "app/console/Printable.h"
 
 #include <cstdlib>
 #include <iostream>
