@@ -2,8 +2,8 @@
 
 #include "app/CommandLine.h"
 
-#include "app/Failure.h"
-#include "app/JsonOutput.h"
+#include "app/console/Failure.h"
+#include "app/console/JsonOutput.h"
 #include "app/edl/ProjectFramerate.h"
 #include "core/settings/Settings.h"
 

@@ -4,10 +4,10 @@
 // the commands are in the other files.
 
 #include "app/CommandLine.h"
-#include "app/Failure.h"
-#include "app/Interruption.h"
-#include "app/PlainStringConverter.h"
-#include "app/Terminal.h"
+#include "app/console/Failure.h"
+#include "app/console/Interruption.h"
+#include "app/console/PlainStringConverter.h"
+#include "app/console/Terminal.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 

@@ -3,7 +3,7 @@
 // The reader of project files on any bytes, and the writer on what it has read.
 
 #include "fuzz/Check.h"
-#include "standin/edit/ChangeLog.h"
+#include "standin/changes/ChangeLog.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 

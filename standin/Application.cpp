@@ -2,22 +2,25 @@
 
 #include "standin/Application.h"
 
-#include "standin/ProjectManager.h"
+#include "standin/HostContext.h"
+#include "standin/HostInfo.h"
+#include "standin/ObjectFactory.h"
+#include "standin/base/Text.h"
+#include "standin/base/Utf16.h"
+#include "standin/edit/ActionManager.h"
+#include "standin/edit/DependencyManager.h"
 #include "standin/edit/EditService.h"
+#include "standin/edit/ProjectManager.h"
+#include "standin/edit/Transport.h"
 #include "standin/file/ProjectFile.h"
-#include "standin/file/Utf16.h"
 #include "standin/project/Project.h"
-#include "standin/project/Text.h"
-#include "standin/services/ActionManager.h"
 #include "standin/services/AlertService.h"
-#include "standin/services/DependencyManager.h"
 #include "standin/services/FileSelector.h"
-#include "standin/services/HostContext.h"
 #include "standin/services/IdleManager.h"
 #include "standin/services/MenuRegistry.h"
 #include "standin/services/ProgressService.h"
 #include "standin/services/Translations.h"
-#include "standin/services/Transport.h"
+#include "standin/services/ViewManager.h"
 #include "standin/services/WindowFactoryRegistry.h"
 
 #include <string>
@@ -25,8 +28,7 @@
 #include <utility>
 #include <vector>
 
-using Velmark::Counted;
-using Velmark::makeCounted;
+using namespace Velmark;
 
 namespace standin {
 
@@ -64,12 +66,27 @@ struct Application::Services {
     Counted<EditService> edits = makeCounted<EditService>(*projects);
     Counted<ActionManager> actions = makeCounted<ActionManager>(*projects, *edits);
     Counted<Transport> transport = makeCounted<Transport>(*projects);
-    Counted<HostContext> context;
+    Counted<HostContext> context = makeCounted<HostContext>();
 };
 
 Application::Application(const Terminal& terminal) : m_services(std::make_unique<Services>(terminal))
 {
-    m_services->context = makeCounted<HostContext>(*this);
+    HostContext& context = *m_services->context;
+    context.offer<IActionManager>(actions());
+    context.offer<IAlertService>(alerts());
+    context.offer<IDependencyManager>(dependencies());
+    context.offer<IEditService>(edits());
+    context.offer<IFileSelector>(fileSelector());
+    context.offer<IHostInfo>(*makeCounted<HostInfo>());
+    context.offer<IIdleManager>(idleManager());
+    context.offer<IMenuRegistry>(menus());
+    context.offer<IObjectFactory>(*makeCounted<ObjectFactory>());
+    context.offer<IProgressService>(progress());
+    context.offer<IProjectManager>(projects());
+    context.offer<ITranslationService>(translations());
+    context.offer<ITransportControl>(transport());
+    context.offer<IViewManager>(*makeCounted<ViewManager>());
+    context.offer<IWindowFactoryRegistry>(windowFactories());
 }
 
 Application::~Application()
@@ -78,7 +95,7 @@ Application::~Application()
         closeProject(*projects().projects().back());
 }
 
-Velmark::IHostContext* Application::context()
+IHostContext* Application::context()
 {
     return m_services->context.get();
 }

@@ -4,7 +4,7 @@
 
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
-#include "standin/file/Utf16.h"
+#include "standin/base/Utf16.h"
 
 #include <utility>
 

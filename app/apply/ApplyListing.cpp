@@ -2,9 +2,9 @@
 
 #include "app/apply/ApplyListing.h"
 
-#include "app/Columns.h"
-#include "app/Printable.h"
-#include "app/Wording.h"
+#include "app/console/Columns.h"
+#include "app/console/Printable.h"
+#include "app/console/Wording.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/settings/Settings.h"

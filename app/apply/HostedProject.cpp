@@ -2,9 +2,9 @@
 
 #include "app/apply/HostedProject.h"
 
-#include "app/Failure.h"
-#include "app/Interruption.h"
-#include "app/Terminal.h"
+#include "app/console/Failure.h"
+#include "app/console/Interruption.h"
+#include "app/console/Terminal.h"
 #include "app/project/ProjectAccess.h"
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextListenerInterface.h"

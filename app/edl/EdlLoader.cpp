@@ -2,11 +2,11 @@
 
 #include "app/edl/EdlLoader.h"
 
-#include "app/Failure.h"
-#include "app/Paths.h"
-#include "app/Printable.h"
-#include "app/Terminal.h"
-#include "app/Wording.h"
+#include "app/console/Failure.h"
+#include "app/console/Paths.h"
+#include "app/console/Printable.h"
+#include "app/console/Terminal.h"
+#include "app/console/Wording.h"
 #include "app/edl/ProjectFramerate.h"
 #include "core/edl/EventBase.h"
 #include "core/fileio/CmxParser.h"

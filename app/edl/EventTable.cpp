@@ -2,7 +2,7 @@
 
 #include "app/edl/EventTable.h"
 
-#include "app/Printable.h"
+#include "app/console/Printable.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>

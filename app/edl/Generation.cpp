@@ -2,10 +2,10 @@
 
 #include "app/edl/Generation.h"
 
-#include "app/Failure.h"
-#include "app/Paths.h"
-#include "app/Terminal.h"
-#include "app/Wording.h"
+#include "app/console/Failure.h"
+#include "app/console/Paths.h"
+#include "app/console/Terminal.h"
+#include "app/console/Wording.h"
 #include "app/edl/GenerationFailure.h"
 #include "core/model/DataModel.h"
 #include "core/settings/VfxNameMatcher.h"

@@ -2,8 +2,8 @@
 
 #include "app/edl/GenerationReport.h"
 
-#include "app/Printable.h"
-#include "app/Wording.h"
+#include "app/console/Printable.h"
+#include "app/console/Wording.h"
 #include "core/edl/HealedEvent.h"
 #include "core/model/DataModel.h"
 #include "core/time/Timecode.h"

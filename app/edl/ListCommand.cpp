@@ -2,12 +2,12 @@
 
 #include "app/edl/ListCommand.h"
 
-#include "app/Failure.h"
-#include "app/Interruption.h"
-#include "app/JsonOutput.h"
-#include "app/Paths.h"
-#include "app/Terminal.h"
-#include "app/Wording.h"
+#include "app/console/Failure.h"
+#include "app/console/Interruption.h"
+#include "app/console/JsonOutput.h"
+#include "app/console/Paths.h"
+#include "app/console/Terminal.h"
+#include "app/console/Wording.h"
 #include "app/edl/EventJson.h"
 #include "app/edl/EventTable.h"
 #include "app/edl/ProjectFramerate.h"

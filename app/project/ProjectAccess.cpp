@@ -2,7 +2,7 @@
 
 #include "app/project/ProjectAccess.h"
 
-#include "app/Paths.h"
+#include "app/console/Paths.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 #include "util/Result.h"

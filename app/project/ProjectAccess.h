@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "app/Failure.h"
+#include "app/console/Failure.h"
 #include "app/project/ProjectClock.h"
 
 #include <string>

@@ -2,8 +2,8 @@
 
 #include "app/project/ProjectContent.h"
 
-#include "app/Printable.h"
-#include "standin/file/Utf16.h"
+#include "app/console/Printable.h"
+#include "standin/base/Utf16.h"
 
 #include <algorithm>
 #include <string_view>

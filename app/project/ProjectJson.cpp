@@ -2,8 +2,8 @@
 
 #include "app/project/ProjectJson.h"
 
-#include "standin/file/Utf16.h"
-#include "standin/project/AttributeList.h"
+#include "standin/base/AttributeList.h"
+#include "standin/base/Utf16.h"
 
 #include <utility>
 

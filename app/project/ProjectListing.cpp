@@ -2,10 +2,10 @@
 
 #include "app/project/ProjectListing.h"
 
-#include "app/Printable.h"
-#include "app/Wording.h"
-#include "standin/file/Utf16.h"
-#include "standin/project/AttributeList.h"
+#include "app/console/Printable.h"
+#include "app/console/Wording.h"
+#include "standin/base/AttributeList.h"
+#include "standin/base/Utf16.h"
 
 #include <algorithm>
 #include <array>

@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "app/Columns.h"
+#include "app/console/Columns.h"
 #include "app/project/ProjectClock.h"
 #include "app/project/ProjectContent.h"
 

@@ -2,20 +2,20 @@
 
 #include "app/project/ShowCommand.h"
 
-#include "app/Failure.h"
-#include "app/Interruption.h"
-#include "app/JsonOutput.h"
-#include "app/Paths.h"
-#include "app/Printable.h"
-#include "app/Terminal.h"
-#include "app/Wording.h"
+#include "app/console/Failure.h"
+#include "app/console/Interruption.h"
+#include "app/console/JsonOutput.h"
+#include "app/console/Paths.h"
+#include "app/console/Printable.h"
+#include "app/console/Terminal.h"
+#include "app/console/Wording.h"
 #include "app/project/ProjectAccess.h"
 #include "app/project/ProjectClock.h"
 #include "app/project/ProjectContent.h"
 #include "app/project/ProjectJson.h"
 #include "app/project/ProjectListing.h"
+#include "standin/base/Utf16.h"
 #include "standin/file/ProjectFile.h"
-#include "standin/file/Utf16.h"
 #include "standin/project/Project.h"
 
 #include <algorithm>

@@ -11,7 +11,7 @@
 #include "examples/reel3/ProductionSound.h"
 #include "examples/reel3/ProgrammeTime.h"
 #include "examples/reel3/SoundCues.h"
-#include "standin/edit/ChangeLog.h"
+#include "standin/changes/ChangeLog.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Marker.h"

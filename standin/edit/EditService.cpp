@@ -2,7 +2,7 @@
 
 #include "standin/edit/EditService.h"
 
-#include "standin/ProjectManager.h"
+#include "standin/edit/ProjectManager.h"
 #include "standin/edit/RangeEdits.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Project.h"
@@ -78,7 +78,7 @@ int32 place(Node& node, Container& container)
     const double containerStart = container.absoluteStart();
     const double start = node.absoluteStart() - containerStart;
     const double end = node.absoluteEnd() - containerStart;
-    if (start <= -SameInstant || node.absoluteEnd() > Project::FurthestTime)
+    if (start <= -SameInstant || node.absoluteEnd() > FurthestTime)
         return EditService::Refused;
     node.insertInto(container);
     node.setSpan(std::max(start, 0.0), std::max(end, 0.0));
@@ -87,7 +87,7 @@ int32 place(Node& node, Container& container)
 
 bool isTime(double seconds)
 {
-    return std::abs(seconds) <= Project::FurthestTime;
+    return std::abs(seconds) <= FurthestTime;
 }
 
 bool isRange(double start, double end)

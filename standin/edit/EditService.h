@@ -2,8 +2,8 @@
 
 #pragma once
 
-#include "standin/edit/ChangeLog.h"
-#include "standin/edit/UndoList.h"
+#include "standin/changes/ChangeLog.h"
+#include "standin/changes/UndoList.h"
 #include "velmark/Editing.h"
 #include "velmark/Implements.h"
 

@@ -79,7 +79,7 @@ Event* continuationOf(const Event& event)
 } // namespace
 
 RangeContent::RangeContent(const Project& project, const std::vector<Track*>& tracks, double start, double end)
-    : m_project(project.link()), m_length(end - start)
+    : m_project(Counted<ProjectLink>::share(project.link())), m_length(end - start)
 {
     if (isEmptyRange(start, end))
         return;

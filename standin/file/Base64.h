@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "standin/project/AttributeList.h"
+#include "standin/base/AttributeList.h"
 
 #include <optional>
 #include <string>

@@ -134,8 +134,4 @@ inline JsonValue::Children JsonValue::children() const
     return Children(*this);
 }
 
-/// Texts and numbers as they stand in JSON. A number has as few digits as lead back to it.
-void appendJsonText(std::string& json, std::string_view text);
-void appendJsonNumber(std::string& json, double number);
-
 } // namespace standin

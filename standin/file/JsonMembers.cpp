@@ -3,6 +3,7 @@
 #include "standin/file/JsonMembers.h"
 
 #include "standin/file/FileFault.h"
+#include "standin/file/JsonText.h"
 #include "standin/project/Project.h"
 
 #include <algorithm>

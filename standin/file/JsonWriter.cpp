@@ -4,6 +4,7 @@
 
 #include "standin/file/FileFault.h"
 #include "standin/file/JsonDocument.h"
+#include "standin/file/JsonText.h"
 
 #include <algorithm>
 #include <utility>

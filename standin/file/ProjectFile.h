@@ -24,7 +24,6 @@ public:
 /// bytes, and a project that was read from them gives them again.
 class ProjectFile {
 public:
-    static constexpr int Version = 1;
     static constexpr const char* Extension = ".stage";
 
     /// Throws ProjectFileError. `log` is the host's.

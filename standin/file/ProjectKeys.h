@@ -9,6 +9,9 @@
 
 namespace standin {
 
+/// The version of the form of project files.
+inline constexpr int ProjectFileVersion = 1;
+
 /// The keys of a project file. docs/project-file.md tells what they mean.
 namespace Key {
 

@@ -2,11 +2,10 @@
 
 #include "standin/file/ProjectReader.h"
 
+#include "standin/base/AttributeList.h"
+#include "standin/base/Utf16.h"
 #include "standin/file/Base64.h"
 #include "standin/file/FileFault.h"
-#include "standin/file/ProjectFile.h"
-#include "standin/file/Utf16.h"
-#include "standin/project/AttributeList.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
@@ -26,7 +25,6 @@ namespace standin {
 
 namespace {
 
-constexpr double FurthestTime = Project::FurthestTime;
 /// A container takes two levels of a file, a list and itself, and so do a curve and its points below the deepest one; what
 /// is unknown has levels of its own.
 constexpr std::size_t DeepestFile = 2 * (Project::DeepestNesting + 2) + Project::DeepestNesting;
@@ -48,10 +46,10 @@ void checkVersion(const JsonMembers& members)
     if (!format || !format->isText() || format->text() != FormatName)
         members.refuse(Key::Format, "isn't " + quoted(FormatName) + ": this is no project");
     const int version = members.wholeNumber(Key::Version, 1, std::numeric_limits<int>::max());
-    if (version > ProjectFile::Version) {
+    if (version > ProjectFileVersion) {
         members.refuse(Key::Version, "is " + std::to_string(version) +
                                          ": written by a newer version than this one, which knows " +
-                                         std::to_string(ProjectFile::Version));
+                                         std::to_string(ProjectFileVersion));
     }
 }
 

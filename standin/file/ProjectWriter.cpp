@@ -2,17 +2,16 @@
 
 #include "standin/file/ProjectWriter.h"
 
+#include "standin/base/AttributeList.h"
+#include "standin/base/Text.h"
+#include "standin/base/Utf16.h"
 #include "standin/file/Base64.h"
 #include "standin/file/FileFault.h"
 #include "standin/file/JsonDocument.h"
-#include "standin/file/ProjectFile.h"
-#include "standin/file/Utf16.h"
-#include "standin/project/AttributeList.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
 #include "standin/project/Project.h"
-#include "standin/project/Text.h"
 #include "standin/project/Track.h"
 
 #include <algorithm>
@@ -28,7 +27,7 @@ namespace {
 
 using Layout = JsonWriter::Layout;
 
-constexpr double AnyTime = -Project::FurthestTime;
+constexpr double AnyTime = -FurthestTime;
 
 template <class Child, class Visit>
 void forEachChild(const Container& container, Visit visit)
@@ -87,7 +86,7 @@ void ProjectWriter::writeProject()
     m_json.beginObject(Layout::Lines);
     enter();
     writeText(Key::Format, FormatName);
-    writeCount(Key::Version, ProjectFile::Version);
+    writeCount(Key::Version, ProjectFileVersion);
     writeName(m_project);
     writeClock();
     writeDetails(m_project, ProjectKeys, Layout::Lines);
@@ -311,7 +310,7 @@ void ProjectWriter::writeUnknownMembers(const Node& node, KnownKeys known)
 
 void ProjectWriter::writeSeconds(std::string_view key, double seconds, double least)
 {
-    writeNumber(key, seconds, least, Project::FurthestTime);
+    writeNumber(key, seconds, least, FurthestTime);
 }
 
 void ProjectWriter::writeNumber(std::string_view key, double number, double least, double most)

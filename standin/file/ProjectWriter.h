@@ -2,9 +2,9 @@
 
 #pragma once
 
+#include "standin/base/Attribute.h"
 #include "standin/file/JsonWriter.h"
 #include "standin/file/ProjectKeys.h"
-#include "standin/project/Attribute.h"
 
 #include <string>
 #include <string_view>

@@ -2,8 +2,6 @@
 
 #include "standin/project/ClipEvent.h"
 
-#include "standin/project/Project.h"
-
 #include <cmath>
 
 using namespace Velmark;

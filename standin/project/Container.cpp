@@ -2,9 +2,6 @@
 
 #include "standin/project/Container.h"
 
-#include "standin/project/Project.h"
-#include "standin/project/Track.h"
-
 using namespace Velmark;
 
 namespace standin {
@@ -79,12 +76,11 @@ Node* Container::firstChildAfter(double time) const
     return static_cast<Node*>(m_children.firstAfter(time));
 }
 
-void Container::markChildChanged(Project& project, Node& child)
+void Container::markChildChanged(ChangeNotes& changes, Node& child)
 {
-    mark(project, ChangeFlag::Children);
-    const Node* const track = child.track();
-    if (track == &child)
-        project.mark(project, ChangeFlag::Children);
+    changes.mark(*this, ChangeFlag::Children);
+    if (child.track() == &child)
+        changes.markProject(ChangeFlag::Children);
     else
         markContentChanged();
 }

@@ -49,7 +49,7 @@ protected:
 private:
     friend class Node;
 
-    void markChildChanged(Project& project, Node& child);
+    void markChildChanged(ChangeNotes& changes, Node& child);
 
     TimeTree m_children;
     std::uint64_t m_nextOrder = 1;

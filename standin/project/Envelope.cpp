@@ -2,9 +2,6 @@
 
 #include "standin/project/Envelope.h"
 
-#include "standin/project/Project.h"
-#include "standin/project/Track.h"
-
 using namespace Velmark;
 
 namespace standin {
@@ -49,7 +46,7 @@ std::string_view Envelope::Curve::nameOf(int32 number)
     }
 }
 
-Envelope::Envelope(Track& track, int32 number) : m_track(&track), m_number(number) {}
+Envelope::Envelope(Node& track, int32 number) : m_track(&track), m_number(number) {}
 
 int32 Envelope::curveNumber()
 {
@@ -61,12 +58,12 @@ IProjectNode* Envelope::getParent()
     return m_track;
 }
 
-Project* Envelope::project()
+ProjectLink* Envelope::link() const
 {
-    return m_track ? m_track->project() : nullptr;
+    return m_track ? m_track->link() : nullptr;
 }
 
-Track* Envelope::track()
+Node* Envelope::track()
 {
     return m_track;
 }

@@ -24,13 +24,14 @@ public:
         static std::string_view nameOf(Velmark::int32 number);
     };
 
-    Envelope(Track& track, Velmark::int32 number);
+    /// `track` is a Track.
+    Envelope(Node& track, Velmark::int32 number);
 
     Velmark::int32 curveNumber() override;
     Velmark::int32 number() const { return m_number; }
     Velmark::IProjectNode* getParent() override;
-    Project* project() override;
-    Track* track() override;
+    ProjectLink* link() const override;
+    Node* track() override;
     bool accepts(const Node& child) const override;
 
     AutomationPoint* firstPoint() const { return static_cast<AutomationPoint*>(firstChild()); }
@@ -43,7 +44,7 @@ public:
 private:
     friend class Track;
 
-    Track* m_track; ///< null when the track has gone
+    Node* m_track; ///< null when the track has gone
     Velmark::int32 m_number;
 };
 

@@ -2,8 +2,6 @@
 
 #include "standin/project/Event.h"
 
-#include "standin/project/Track.h"
-
 #include <algorithm>
 #include <cmath>
 #include <string_view>
@@ -27,8 +25,8 @@ Event::Event() : m_origin(nextOrigin()) {}
 
 bool Event::isType(const char* word)
 {
-    const Track* const track = this->track();
-    return word && track && std::string_view(word) == Track::wordOf(track->kind());
+    Node* const track = this->track();
+    return word && std::string_view(word) != TypeWord::Track && track && track->isType(word);
 }
 
 IEventNode* Event::getOwner()

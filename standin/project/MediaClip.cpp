@@ -2,8 +2,6 @@
 
 #include "standin/project/MediaClip.h"
 
-#include "standin/project/Project.h"
-
 #include <algorithm>
 #include <cmath>
 #include <limits>
@@ -37,11 +35,10 @@ bool MediaClip::isType(const char* word)
 
 uint32 MediaClip::getFrameCount()
 {
-    const Project* const project = this->project();
-    if (!project)
+    if (!link())
         return 0;
     constexpr double Most = std::numeric_limits<uint32>::max();
-    return static_cast<uint32>(std::min(std::round(seconds() * project->frameRate().framesPerSecond), Most));
+    return static_cast<uint32>(std::min(std::round(seconds() * m_framesPerSecond), Most));
 }
 
 IFilePath* MediaClip::getFile()
@@ -65,17 +62,17 @@ void MediaClip::updateCaption()
     m_caption = std::move(caption);
 }
 
-Project* MediaClip::project()
+ProjectLink* MediaClip::link() const
 {
-    return m_pool ? m_pool->project() : nullptr;
+    return m_link && m_link->project() ? m_link.get() : nullptr;
 }
 
 void MediaClip::markContentChanged()
 {
     updateCaption();
     Node::markContentChanged();
-    if (Project* const project = this->project())
-        project->notePoolChanged();
+    if (ProjectLink* const link = this->link())
+        link->changes().markPool();
 }
 
 } // namespace standin

@@ -2,15 +2,13 @@
 
 #pragma once
 
+#include "standin/base/FilePath.h"
 #include "standin/project/Node.h"
-#include "standin/services/FilePath.h"
 #include "velmark/Media.h"
 
 #include <mutex>
 
 namespace standin {
-
-class MediaPool;
 
 /// A file of sound or of picture in the media pool.
 class MediaClip : public Velmark::Implements<MediaClip, Node, Velmark::IMediaClip> {
@@ -27,7 +25,7 @@ public:
     Velmark::IFilePath* getFile() override;
 
     /// That of its pool; null when it is in none.
-    Project* project() override;
+    ProjectLink* link() const override;
     Kind kind() const { return m_kind; }
     const std::u16string& path() const { return m_path; }
     double seconds() const { return length(); }
@@ -53,7 +51,8 @@ private:
     std::u16string m_path;
     Velmark::Counted<FilePath> m_file; ///< what was handed out
     int m_number = 0;
-    MediaPool* m_pool = nullptr;
+    Velmark::Counted<ProjectLink> m_link; ///< null when it is in no pool
+    double m_framesPerSecond = 0.0;       ///< of the project, as its pool says
     mutable std::mutex m_captionMutex;
     Caption m_caption;
 };

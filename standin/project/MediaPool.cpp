@@ -2,8 +2,6 @@
 
 #include "standin/project/MediaPool.h"
 
-#include "standin/project/Project.h"
-
 #include <limits>
 #include <string_view>
 
@@ -14,7 +12,7 @@ namespace standin {
 MediaPool::~MediaPool()
 {
     for (const auto& [number, clip] : m_clips)
-        clip->m_pool = nullptr;
+        clip->m_link.reset();
 }
 
 int32 MediaPool::count(const char* type)
@@ -81,16 +79,20 @@ void MediaPool::add(Counted<MediaClip> clip, int number)
     if (number == 0)
         number = freeNumber();
     clip->m_number = number;
-    clip->m_pool = this;
+    clip->m_link = m_link;
+    clip->m_framesPerSecond = m_framesPerSecond;
     MediaClip& added = *clip;
     m_clips.emplace(number, std::move(clip));
     added.markContentChanged();
 }
 
-void MediaPool::frameRateChanged()
+void MediaPool::setFrameRate(double framesPerSecond)
 {
-    for (const auto& [number, clip] : m_clips)
+    m_framesPerSecond = framesPerSecond;
+    for (const auto& [number, clip] : m_clips) {
+        clip->m_framesPerSecond = framesPerSecond;
         clip->updateCaption();
+    }
 }
 
 } // namespace standin

@@ -6,6 +6,7 @@
 
 #include <map>
 #include <span>
+#include <utility>
 #include <vector>
 
 namespace standin {
@@ -15,7 +16,8 @@ class MediaPool : public Velmark::Implements<MediaPool, Velmark::FObject, Velmar
 public:
     static constexpr const char* ClassName = "MediaPool";
 
-    explicit MediaPool(Project& project) : m_project(&project) {}
+    /// `link` is that of its project.
+    explicit MediaPool(Velmark::Counted<ProjectLink> link) : m_link(std::move(link)) {}
     ~MediaPool() override;
 
     Velmark::int32 count(const char* type) override;
@@ -30,20 +32,16 @@ public:
     /// Gives the clip the next free number, or the one asked for, which must be free and above 0.
     void add(Velmark::Counted<MediaClip> clip, int number = 0);
 
-    /// The clips last other numbers of frames from now on.
-    void frameRateChanged();
-
-    /// Null when the project has gone.
-    Project* project() const { return m_project; }
+    /// That of the project, by which the clips count their frames. 0 at first.
+    void setFrameRate(double framesPerSecond);
 
 private:
-    friend class Project;
-
     int freeNumber() const;
     /// The clips of the type word, in the order of their numbers.
     std::span<MediaClip* const> clipsOf(const char* type);
 
-    Project* m_project;
+    Velmark::Counted<ProjectLink> m_link;
+    double m_framesPerSecond = 0.0;
     std::map<int, Velmark::Counted<MediaClip>> m_clips;
     // What clipsOf gives, so that a walk over a large pool by index takes no time.
     std::vector<MediaClip*> m_audio;

@@ -2,16 +2,9 @@
 
 #include "standin/project/Node.h"
 
-#include "standin/edit/ChangeLog.h"
-#include "standin/project/AttributeList.h"
-#include "standin/project/Container.h"
-#include "standin/project/Project.h"
-#include "standin/project/Text.h"
-#include "standin/project/Track.h"
+#include "standin/base/AttributeList.h"
+#include "standin/base/Text.h"
 #include "velmark/IString.h"
-
-#include <algorithm>
-#include <cmath>
 
 using namespace Velmark;
 
@@ -111,40 +104,6 @@ int32 Node::setName(FUnknown* /*container*/, IString* name, int32 /*reserved*/)
     return ResultOk;
 }
 
-double Node::getStart(FUnknown* container)
-{
-    return start() - offsetOf(container).value_or(-parentStart());
-}
-
-int32 Node::setStart(FUnknown* container, int32 /*reserved*/, double seconds)
-{
-    const std::optional<double> offset = offsetOf(container);
-    if (!offset || extent() == Extent::Fixed)
-        return ResultFalse;
-    const double moved = seconds + *offset;
-    return setCheckedSpan(moved, moved + length());
-}
-
-int32 Node::setLength(FUnknown* container, FUnknown* /*transaction*/, double seconds)
-{
-    if (!offsetOf(container) || extent() != Extent::Stretch)
-        return ResultFalse;
-    return setCheckedSpan(start(), start() + seconds);
-}
-
-double Node::getEnd(FUnknown* container)
-{
-    return lastEnd() - offsetOf(container).value_or(-parentStart());
-}
-
-int32 Node::setEnd(FUnknown* container, int32 /*reserved*/, double seconds)
-{
-    const std::optional<double> offset = offsetOf(container);
-    if (!offset || extent() != Extent::Stretch)
-        return ResultFalse;
-    return setCheckedSpan(start(), seconds + *offset);
-}
-
 double Node::getSourceOffset(FUnknown* /*container*/)
 {
     return 0.0;
@@ -153,57 +112,6 @@ double Node::getSourceOffset(FUnknown* /*container*/)
 INodeIterator* Node::newChildIterator()
 {
     return makeCounted<NoChildren>().detach();
-}
-
-IProjectNode* Node::getParent()
-{
-    return m_parent;
-}
-
-Project* Node::project()
-{
-    return m_parent ? m_parent->project() : nullptr;
-}
-
-Track* Node::track()
-{
-    return m_parent ? m_parent->track() : nullptr;
-}
-
-double Node::absoluteStart() const
-{
-    return parentStart() + start();
-}
-
-double Node::absoluteEnd() const
-{
-    return parentStart() + end();
-}
-
-void Node::setSpan(double start, double end)
-{
-    if (start != this->start() || end != this->end())
-        change(*this, &Node::exchangeSpan, Span{start, end});
-}
-
-void Node::insertInto(Container& parent)
-{
-    moveTo({&parent, parent.m_nextOrder++});
-}
-
-void Node::remove()
-{
-    if (m_parent)
-        moveTo({});
-}
-
-void Node::moveTo(Place place)
-{
-    const auto keptAlive = Counted<Node>::share(this);
-    Project* const former = recordingProject();
-    Place other = exchangePlace(place);
-    if (Project* const recording = former ? former : recordingProject())
-        record(*recording, std::make_unique<ValueEdit<Node, Place>>(*this, &Node::exchangePlace, other));
 }
 
 void Node::setName(std::u16string name)
@@ -239,97 +147,19 @@ void Node::setUnknownMembers(std::string json)
         extras().unknownMembers = std::move(json);
 }
 
-void Node::mark(Project& project, uint32 flags)
+void Node::markRemoved(ChangeNotes& changes)
 {
-    if (m_marks == 0)
-        project.noteMarked(*this);
-    m_marks = static_cast<uint8>(m_marks | flags);
-}
-
-void Node::markRemoved(Project& project)
-{
-    mark(project, ChangeFlag::Removed);
+    changes.mark(*this, ChangeFlag::Removed);
 }
 
 void Node::markContentChanged()
 {
-    Project* const project = this->project();
-    if (!project)
+    ProjectLink* const link = this->link();
+    if (!link)
         return;
-    if (Track* const track = this->track())
-        track->mark(*project, ChangeFlag::Content);
-    project->mark(*project, ChangeFlag::Content);
-}
-
-bool Node::canBelongTo(const Project& project)
-{
-    const ProjectLink* const home = this->home();
-    return !home || home->project == &project;
-}
-
-const ProjectLink* Node::home()
-{
-    Node* node = this;
-    while (node && !node->m_home)
-        node = static_cast<Node*>(node->getParent());
-    return node ? node->m_home.get() : nullptr;
-}
-
-Project* Node::recordingProject()
-{
-    Project* project = this->project();
-    // What was taken out comes back when that is undone, and has to be what it was.
-    if (const ProjectLink* const home = project ? nullptr : this->home())
-        project = home->project;
-    return project && project->isOpen() && project->log().isOpen() ? project : nullptr;
-}
-
-void Node::record(Project& project, std::unique_ptr<Edit> edit)
-{
-    project.log().add(project, std::move(edit));
-}
-
-void Node::leaveParent()
-{
-    m_parent->m_children.erase(*this);
-    m_parent = nullptr;
-    release();
-}
-
-Node::Place Node::exchangePlace(Place place)
-{
-    const auto keptAlive = Counted<Node>::share(this);
-    const Place former{m_parent, order};
-    if (m_parent) {
-        if (Project* const project = this->project()) {
-            m_home = project->link();
-            markRemoved(*project);
-            m_parent->markChildChanged(*project, *this);
-        }
-        leaveParent();
-    }
-    order = place.order;
-    if (place.parent) {
-        addRef();
-        m_parent = place.parent;
-        m_parent->m_children.insert(*this);
-        if (Project* const project = this->project()) {
-            m_home = project->link();
-            m_parent->markChildChanged(*project, *this);
-        }
-    }
-    return former;
-}
-
-Node::Span Node::exchangeSpan(Span span)
-{
-    if (m_parent)
-        m_parent->m_children.erase(*this);
-    const Span former{std::exchange(TimeSpan::start, span.start), std::exchange(TimeSpan::end, span.end)};
-    if (m_parent)
-        m_parent->m_children.insert(*this);
-    markContentChanged();
-    return former;
+    if (Node* const track = this->track())
+        link->changes().mark(*track, ChangeFlag::Content);
+    link->changes().markProject(ChangeFlag::Content);
 }
 
 std::u16string Node::exchangeName(std::u16string name)
@@ -353,36 +183,6 @@ Node::KeyedAttribute Node::exchangeAttribute(KeyedAttribute attribute)
         attributes.erase(found);
     markContentChanged();
     return {std::move(key), std::move(former)};
-}
-
-double Node::parentStart() const
-{
-    return m_parent ? m_parent->absoluteStart() : 0.0;
-}
-
-std::optional<double> Node::offsetOf(FUnknown* container)
-{
-    if (!container)
-        return -parentStart();
-    auto* const node = dynamic_cast<Node*>(container);
-    if (!node || (node->project() && project() && node->project() != project()))
-        return std::nullopt;
-    const Node* const context = node->holdsChildren() ? node : node->parent();
-    if (!context)
-        return std::nullopt;
-    return context->absoluteStart() - parentStart();
-}
-
-int32 Node::setCheckedSpan(double start, double end)
-{
-    if (!std::isfinite(start) || !std::isfinite(end) || start <= -SameInstant || end - start <= -SameInstant)
-        return ResultFalse;
-    if (parentStart() + end > Project::FurthestTime)
-        return ResultFalse;
-    // Sums and differences of times are a hair off at times.
-    start = std::max(start, 0.0);
-    setSpan(start, std::max(start, end));
-    return ResultOk;
 }
 
 Node::Extras& Node::extras()

@@ -2,9 +2,10 @@
 
 #pragma once
 
-#include "standin/edit/Edit.h"
-#include "standin/project/Attribute.h"
-#include "standin/project/TimeTree.h"
+#include "standin/base/Attribute.h"
+#include "standin/base/TimeTree.h"
+#include "standin/base/Times.h"
+#include "standin/changes/ProjectLink.h"
 #include "velmark/Implements.h"
 #include "velmark/ProjectNode.h"
 
@@ -16,27 +17,13 @@
 namespace standin {
 
 class Container;
-class Project;
-class Track;
-
-/// Edges that are closer than this, in seconds, are one instant.
-inline constexpr double SameInstant = 1.0 / 384000;
-
-/// How a project can be found as long as it is there.
-struct ProjectLink : Velmark::Implements<ProjectLink, Velmark::FObject> {
-    static constexpr const char* ClassName = "ProjectLink";
-
-    explicit ProjectLink(Project& linked) : project(&linked) {}
-
-    Project* project; ///< null when it has gone
-};
 
 /// The base of every object of a project. It lies in one container at most, which holds a reference to it; its times are
 /// counted from the start of that container, and from time 0 while it lies in none.
 ///
 /// Each change is made through an exchange of an old value for a new one. When the node belongs to a project, the change
-/// goes to the ChangeLog, whose transaction may be open, and the project notes whom to tell of it.
-class Node : public Velmark::Implements<Node, Velmark::FObject, Velmark::IProjectNode>, private TimeSpan {
+/// goes to the ChangeLog, whose transaction may be open, and into the ChangeNotes, for those who are told of it.
+class Node : public Velmark::Implements<Node, MarkedObject, Velmark::IProjectNode>, private TimeSpan {
 public:
     static constexpr const char* ClassName = "Node";
 
@@ -46,7 +33,7 @@ public:
 
     // IProjectNode
     bool isType(const char* word) override;
-    Velmark::uint32 changeFlags() override { return m_changeFlags; }
+    Velmark::uint32 changeFlags() override { return shownMarks(); }
     Velmark::int32 setAttribute(const char* key, const Velmark::FVariant& value, bool persistent) override;
     Velmark::int32 getAttribute(const char* key, Velmark::FVariant& value) override;
     Velmark::int32 hasAttribute(const char* key) override;
@@ -66,9 +53,12 @@ public:
     // Where it stands.
 
     Container* parent() const { return m_parent; }
-    /// The node itself, or the nearest above it, that is such; null when there is none.
-    virtual Project* project();
-    virtual Track* track();
+    /// The link of the project in which it is; null when it is in none.
+    virtual ProjectLink* link() const;
+    /// Null when it is in none.
+    Project* project() const;
+    /// The track that it is or on which it lies; null when there is none.
+    virtual Node* track();
     /// Whether it is in the project or may be put into it: a node that has been in one is known to the undo list there, and
     /// not fit for another.
     bool canBelongTo(const Project& project);
@@ -111,15 +101,6 @@ public:
     const std::string& unknownMembers() const;
     void setUnknownMembers(std::string json);
 
-    // What happened to it, as Velmark::ChangeFlag bits. Marks are collected until the project shows them to those who are
-    // told.
-
-    void mark(Project& project, Velmark::uint32 flags);
-    /// Makes the marks the answer of changeFlags().
-    void showMarks() { m_changeFlags = static_cast<Velmark::uint8>(m_changeFlags | m_marks); }
-    void hideMarks() { m_changeFlags = 0; }
-    void clearMarks() { m_marks = 0; }
-
 protected:
     /// What of its span can be changed through its interface: nothing, where it stands, or its length too.
     enum class Extent { Fixed, Instant, Stretch };
@@ -128,7 +109,7 @@ protected:
 
     virtual Extent extent() const { return Extent::Fixed; }
     /// Marks what has moved away with this node: itself, and the tracks below it.
-    virtual void markRemoved(Project& project);
+    virtual void markRemoved(ChangeNotes& changes);
     /// Marks the track and the project of this node.
     virtual void markContentChanged();
 
@@ -137,8 +118,8 @@ protected:
     void change(Object& object, Value (Object::*exchange)(Value), Value value)
     {
         Value former = (object.*exchange)(std::move(value));
-        if (Project* const recording = recordingProject())
-            record(*recording, std::make_unique<ValueEdit<Object, Value>>(object, exchange, std::move(former)));
+        if (ProjectLink* const recording = recordingLink())
+            recording->record(std::make_unique<ValueEdit<Object, Value>>(object, exchange, std::move(former)));
     }
 
 private:
@@ -167,12 +148,11 @@ private:
 
     void moveTo(Place place);
     void leaveParent();
-    /// How the project is found that the node is in, or in which it was before it or something around it was taken out; null
+    /// The link of the project that the node is in, or in which it was before it or something around it was taken out; null
     /// when there was none.
-    const ProjectLink* home();
-    /// That project when it is open and a transaction is; else null.
-    Project* recordingProject();
-    static void record(Project& project, std::unique_ptr<Edit> edit);
+    ProjectLink* home();
+    /// That link when edits are taken down; else null.
+    ProjectLink* recordingLink();
 
     /// The absolute start of the parent; 0 without one.
     double parentStart() const;
@@ -188,8 +168,6 @@ private:
     Velmark::Counted<ProjectLink> m_home; ///< to the project into which it was put; null when only its container was
     std::u16string m_name;
     std::unique_ptr<Extras> m_extras;
-    Velmark::uint8 m_marks = 0;
-    Velmark::uint8 m_changeFlags = 0;
     bool m_isSelected = false;
 };
 

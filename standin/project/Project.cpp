@@ -2,8 +2,8 @@
 
 #include "standin/project/Project.h"
 
+#include "standin/base/FilePath.h"
 #include "standin/project/Track.h"
-#include "standin/services/FilePath.h"
 #include "velmark/Module.h"
 
 #include <algorithm>
@@ -48,18 +48,18 @@ void collectTracks(const Container& container, std::vector<Track*>& tracks)
 } // namespace
 
 Project::Project(ChangeLog& log)
-    : m_log(log), m_link(makeCounted<ProjectLink>(*this)), m_frameRate{24.0, 0}, m_pool(makeCounted<MediaPool>(*this)),
+    : m_link(makeCounted<ProjectLink>(*this, *this, log)), m_frameRate{24.0, 0}, m_pool(makeCounted<MediaPool>(m_link)),
       m_locatorLeft(makeCounted<Parameter>()), m_locatorRight(makeCounted<Parameter>()),
       m_cycleLeft(makeCounted<Parameter>()), m_cycleRight(makeCounted<Parameter>()),
       m_position(makeCounted<Parameter>()), m_locators(makeCounted<Locators>(m_locatorLeft, m_locatorRight))
 {
+    m_pool->setFrameRate(m_frameRate.framesPerSecond);
 }
 
 Project::~Project()
 {
     clearChanges();
-    m_pool->m_project = nullptr;
-    m_link->project = nullptr;
+    m_link->cut();
 }
 
 int32 Project::setProjectEnd(double seconds)
@@ -149,14 +149,14 @@ bool Project::accepts(const Node& child) const
 void Project::setFrameRate(const FrameRateInfo& info)
 {
     m_frameRate = info;
-    m_pool->frameRateChanged();
-    mark(*this, ChangeFlag::Content);
+    m_pool->setFrameRate(info.framesPerSecond);
+    m_link->changes().markProject(ChangeFlag::Content);
 }
 
 void Project::setTimeOrigin(double seconds)
 {
     m_timeOrigin = seconds;
-    mark(*this, ChangeFlag::Content);
+    m_link->changes().markProject(ChangeFlag::Content);
 }
 
 MarkerTrack* Project::defaultMarkerTrack() const
@@ -173,51 +173,6 @@ std::vector<Track*> Project::allTracks() const
     std::vector<Track*> tracks;
     collectTracks(*this, tracks);
     return tracks;
-}
-
-void Project::noteMarked(Node& node)
-{
-    m_isMarked = true;
-    if (&node != this)
-        m_marked.push_back(Counted<Node>::share(&node));
-}
-
-void Project::showChanges()
-{
-    showMarks();
-    for (const Counted<Node>& node : m_marked)
-        node->showMarks();
-}
-
-void Project::startTelling()
-{
-    showChanges();
-    clearMarks();
-    for (Counted<Node>& node : m_marked) {
-        node->clearMarks();
-        m_told.push_back(std::move(node));
-    }
-    m_marked.clear();
-    m_isMarked = false;
-    m_tellsOfPool = std::exchange(m_hasPoolChanged, false);
-}
-
-void Project::endTelling()
-{
-    hideMarks();
-    const std::vector<Counted<Node>> told = std::exchange(m_told, {});
-    for (const Counted<Node>& node : told)
-        node->hideMarks();
-    // An edit hook may have been shown more while others were told.
-    for (const Counted<Node>& node : m_marked)
-        node->hideMarks();
-    m_tellsOfPool = false;
-}
-
-void Project::clearChanges()
-{
-    startTelling();
-    endTelling();
 }
 
 void Project::announceStoring()

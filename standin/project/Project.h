@@ -2,12 +2,11 @@
 
 #pragma once
 
-#include "standin/edit/ChangeLog.h"
-#include "standin/edit/UndoList.h"
+#include "standin/base/HandlerList.h"
+#include "standin/base/Parameter.h"
+#include "standin/changes/UndoList.h"
 #include "standin/project/Container.h"
 #include "standin/project/MediaPool.h"
-#include "standin/project/Parameter.h"
-#include "standin/services/HandlerList.h"
 #include "velmark/Project.h"
 
 #include <string>
@@ -19,14 +18,10 @@ class MarkerTrack;
 class Track;
 
 /// A project: the root of the tracks, the media pool and the clock, and what the user sees of them.
-///
-/// It notes which of its objects have changed, and keeps them alive until all listeners have been called.
 class Project : public Velmark::Implements<Project, Container, Velmark::IProjectDocument, Velmark::ITimeBase> {
 public:
     static constexpr const char* ClassName = "Project";
 
-    /// All that is measured in time is limited to this, in seconds: over 30 years.
-    static constexpr double FurthestTime = 1e9;
     /// How many containers lie in one another at the most, the project included.
     static constexpr int DeepestNesting = 100;
 
@@ -49,7 +44,7 @@ public:
     Velmark::int32 getFrameRate(Velmark::FrameRateInfo& info) override;
     double getTimeOrigin() override;
 
-    Project* project() override { return this; }
+    ProjectLink* link() const override { return m_link.get(); }
     /// The later of the set end and the end of the last event or marker.
     double lastEnd() const override;
     bool accepts(const Node& child) const override;
@@ -78,27 +73,19 @@ public:
     std::vector<Track*> allTracks() const;
 
     /// Whether it is open in the host; only then do its changes go to the log.
-    bool isOpen() const { return m_isOpen; }
-    void setOpen(bool isOpen) { m_isOpen = isOpen; }
-    ChangeLog& log() { return m_log; }
-    const Velmark::Counted<ProjectLink>& link() const { return m_link; }
+    bool isOpen() const { return m_link->isOpen(); }
+    void setOpen(bool isOpen) { m_link->setOpen(isOpen); }
+    ChangeLog& log() { return m_link->log(); }
     UndoList& undoList() { return m_undoList; }
 
-    /// Notes a node whose first mark was just set.
-    void noteMarked(Node& node);
-    void notePoolChanged() { m_hasPoolChanged = true; }
-    /// Whether something has changed that isn't told yet.
-    bool hasChanges() const { return m_isMarked || m_hasPoolChanged; }
-    /// From now on the nodes answer what was marked so far as their change flags.
-    void showChanges();
-    /// Shows them to those who are told of them now. What is marked from here on is to be told another time.
-    void startTelling();
-    /// All have been told: no flag is shown any more, and what was kept alive for the telling alone is dropped.
-    void endTelling();
-    /// Whether the pool is among what is told.
-    bool tellsOfPool() const { return m_tellsOfPool; }
-    /// Nothing of what has happened so far counts as a change.
-    void clearChanges();
+    // What has changed and isn't told yet, as ChangeNotes says.
+
+    bool hasChanges() const { return m_link->changes().hasChanges(); }
+    void showChanges() { m_link->changes().show(); }
+    void startTelling() { m_link->changes().startTelling(); }
+    void endTelling() { m_link->changes().endTelling(); }
+    bool tellsOfPool() const { return m_link->changes().tellsOfPool(); }
+    void clearChanges() { m_link->changes().clear(); }
 
     /// Calls the storage listeners, for a save that is about to be made.
     void announceStoring();
@@ -106,10 +93,8 @@ public:
 private:
     double exchangeEndTime(double seconds);
 
-    ChangeLog& m_log;
     Velmark::Counted<ProjectLink> m_link;
     UndoList m_undoList;
-    bool m_isOpen = false;
     std::u16string m_path;
     Velmark::FrameRateInfo m_frameRate;
     double m_timeOrigin = 0.0;
@@ -122,12 +107,6 @@ private:
     Velmark::Counted<Parameter> m_position;
     Velmark::Counted<Velmark::ILocators> m_locators;
     HandlerList<Velmark::IProjectStorageNotification> m_storageListeners;
-    // The project itself is in neither list: it can't keep itself alive.
-    std::vector<Velmark::Counted<Node>> m_marked;
-    std::vector<Velmark::Counted<Node>> m_told;
-    bool m_isMarked = false;
-    bool m_hasPoolChanged = false;
-    bool m_tellsOfPool = false;
 };
 
 } // namespace standin

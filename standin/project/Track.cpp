@@ -2,11 +2,10 @@
 
 #include "standin/project/Track.h"
 
+#include "standin/base/ObjectList.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
-#include "standin/project/Project.h"
-#include "standin/services/ObjectList.h"
 
 #include <algorithm>
 #include <array>
@@ -134,13 +133,13 @@ Envelope& Track::curve(int32 number)
     return *curve;
 }
 
-void Track::markRemoved(Project& project)
+void Track::markRemoved(ChangeNotes& changes)
 {
-    Node::markRemoved(project);
+    Node::markRemoved(changes);
     if (!isFolder())
         return;
     for (Node* child = firstChild(); child; child = childBehind(*child))
-        static_cast<Track&>(*child).markRemoved(project);
+        static_cast<Track&>(*child).markRemoved(changes);
 }
 
 bool Track::exchangeLocked(bool locked)

@@ -51,7 +51,7 @@ public:
 protected:
     explicit Track(Kind kind) : m_kind(kind) {}
 
-    void markRemoved(Project& project) override;
+    void markRemoved(ChangeNotes& changes) override;
 
 private:
     bool exchangeLocked(bool locked);

@@ -2,7 +2,7 @@
 
 #include "standin/services/FileSelector.h"
 
-#include "standin/services/FilePath.h"
+#include "standin/base/FilePath.h"
 #include "velmark/Counted.h"
 #include "velmark/Editing.h"
 

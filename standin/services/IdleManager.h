@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "standin/services/HandlerList.h"
+#include "standin/base/HandlerList.h"
 #include "velmark/Context.h"
 #include "velmark/Implements.h"
 #include "velmark/Module.h"

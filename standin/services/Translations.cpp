@@ -2,8 +2,8 @@
 
 #include "standin/services/Translations.h"
 
-#include "standin/file/Utf16.h"
-#include "standin/project/Text.h"
+#include "standin/base/Text.h"
+#include "standin/base/Utf16.h"
 
 #include <filesystem>
 #include <pugixml.hpp>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/services/HostContext.h"
+#include "standin/HostContext.h"
 
 #include "standin/services/AlertService.h"
 #include "tests/support/standin/TestHost.h"

@@ -4,7 +4,7 @@
 
 #include "host/border/HostFailure.h"
 #include "host/undo/DataModelEditStep.h"
-#include "standin/project/AttributeList.h"
+#include "standin/base/AttributeList.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/EventMaking.h"

@@ -4,7 +4,7 @@
 
 #include "core/notify/ChangeContext.h"
 #include "host/border/HostFailure.h"
-#include "standin/project/Parameter.h"
+#include "standin/base/Parameter.h"
 #include "tests/host/project/AlteredDocument.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/EventMaking.h"

@@ -3,9 +3,9 @@
 #include "host/services/FileBrowserDialog.h"
 
 #include "standin/Application.h"
-#include "standin/services/FilePath.h"
+#include "standin/base/FilePath.h"
+#include "standin/base/ObjectList.h"
 #include "standin/services/FileSelector.h"
-#include "standin/services/ObjectList.h"
 #include "tests/support/PlainConverter.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/host/AlteredContext.h"

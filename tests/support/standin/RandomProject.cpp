@@ -2,8 +2,8 @@
 
 #include "tests/support/standin/RandomProject.h"
 
+#include "standin/base/AttributeList.h"
 #include "standin/file/ProjectKeys.h"
-#include "standin/project/AttributeList.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Envelope.h"
 #include "standin/project/Marker.h"

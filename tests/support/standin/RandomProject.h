@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "standin/edit/ChangeLog.h"
+#include "standin/changes/ChangeLog.h"
 #include "standin/project/Project.h"
 #include "velmark/Counted.h"
 

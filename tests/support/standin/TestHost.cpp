@@ -2,8 +2,8 @@
 
 #include "tests/support/standin/TestHost.h"
 
-#include "standin/ProjectManager.h"
 #include "standin/edit/EditService.h"
+#include "standin/edit/ProjectManager.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/MediaClip.h"
 #include "standin/project/Part.h"

@@ -1,0 +1,65 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/console/JsonOutput.h"
+
+#include "app/console/Failure.h"
+#include "app/console/Interruption.h"
+#include "app/console/Paths.h"
+#include "util/FilePath.h"
+#include "util/Result.h"
+
+#include <iostream>
+
+namespace cadrel::app {
+
+using util::Result;
+
+JsonOutput::JsonOutput(const std::string& path) : m_path(path)
+{
+    if (isStandardOutput(path))
+        return;
+    const auto target = util::toFilePath(toWide(path));
+    orUnwritable([&] { m_file.emplace(target); });
+}
+
+/// Does what fails when the file can't be written.
+template <class Action>
+void JsonOutput::orUnwritable(Action action)
+{
+    try {
+        action();
+    } catch (const Result::Type&) {
+        throw unwritable({m_path});
+    }
+}
+
+void JsonOutput::write(std::string_view text)
+{
+    Interruption::check();
+    if (m_file)
+        orUnwritable([&] { m_file->write(text); });
+    else
+        std::cout << text;
+}
+
+void JsonOutput::finish()
+{
+    if (m_file)
+        orUnwritable([&] { m_file->putInPlace(); });
+    else
+        flushStandardOutput();
+}
+
+void JsonOutput::keep()
+{
+    if (m_file)
+        m_file->keep();
+}
+
+void flushStandardOutput()
+{
+    if (!std::cout.flush())
+        throw Failure{"standard output", "can't be written", "see whether the disk is full"};
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,121 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/console/Paths.h"
+
+#include "app/console/Printable.h"
+#include "util/StringUtil.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <optional>
+#include <system_error>
+#include <unistd.h>
+
+namespace cadrel::app {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+/// Bytes, on the file systems in use.
+constexpr std::size_t LongestName = 255;
+
+} // namespace
+
+std::wstring toWide(const std::string& path)
+{
+    if (!isUtf8(path))
+        throw Failure{path, "the name is no UTF-8 text", "rename the file or its folder"};
+    return util::StringUtil::toWide(path);
+}
+
+std::string fileNameOf(const std::string& path)
+{
+    return fs::path(path).filename().string();
+}
+
+bool isSameFile(const std::string& a, const std::string& b)
+{
+    std::error_code error;
+    const bool aExists = fs::exists(a, error);
+    const bool bExists = fs::exists(b, error);
+    if (aExists && bExists)
+        return fs::is_regular_file(a, error) && fs::equivalent(a, b, error);
+    if (aExists || bExists)
+        return false;
+    const fs::path fullA = fs::weakly_canonical(fs::absolute(a, error), error);
+    const fs::path fullB = fs::weakly_canonical(fs::absolute(b, error), error);
+    return !fullA.empty() && fullA == fullB;
+}
+
+void refuseToOverwrite(const std::vector<std::string>& files, const std::string& output)
+{
+    const auto same = [&output](const std::string& file) { return isSameFile(file, output); };
+    if (std::any_of(files.begin(), files.end(), same))
+        throw UsageError{output + ": writing it would overwrite another file of this run", "give another name"};
+}
+
+Failure unreadable(const std::string& path, FileKind kind)
+{
+    const bool wantsEdl = kind == FileKind::Edl;
+    std::error_code error;
+    const fs::file_status status = fs::status(path, error);
+    switch (status.type()) {
+    case fs::file_type::not_found:
+        return {path, "no such file", "check the name and the folder"};
+    case fs::file_type::directory:
+        return {path, "is a folder", wantsEdl ? "give the EDL files in it" : "give the project file in it"};
+    case fs::file_type::character:
+    case fs::file_type::block:
+        return {path, "is a device", wantsEdl ? "give an EDL file" : "give a project file"};
+    case fs::file_type::fifo:
+    case fs::file_type::socket:
+        return {path, "is a pipe", "write it into a file first"};
+    case fs::file_type::none:
+        return {path, "can't be reached: " + error.message(), "check the name and the folder"};
+    default:
+        break;
+    }
+    if (access(path.c_str(), R_OK) != 0)
+        return {path, "you may not read it", "ask its owner for the right to read"};
+    return {path, "can't be read to its end", "check the disk or copy the file anew"};
+}
+
+namespace {
+
+std::optional<Failure> obstacleToWriting(const std::string& path)
+{
+    std::error_code error;
+    if (fs::is_directory(path, error))
+        return Failure{path, "is a folder", "give the name of a file in it"};
+    const fs::path parent = fs::path(path).parent_path();
+    const fs::path folder = parent.empty() ? fs::path(".") : parent;
+    if (!fs::exists(folder, error))
+        return Failure{path, "the folder does not exist", "make it or give another"};
+    if (!fs::is_directory(folder, error))
+        return Failure{path, "what should be the folder is a file", "give another name"};
+    if (fs::path(path).filename().string().size() > LongestName)
+        return Failure{path, "the name is too long", "give a shorter one"};
+    const bool exists = fs::exists(path, error);
+    if (exists && access(path.c_str(), W_OK) != 0)
+        return Failure{path, "is protected against writing", "give another name"};
+    const bool isReplaced = !exists || fs::is_regular_file(path, error);
+    if (isReplaced && access(folder.c_str(), W_OK) != 0)
+        return Failure{path, "you may not write into the folder", "give another folder"};
+    if (!isReplaced)
+        return Failure{path, "can't be written", "see whether the disk is full"};
+    return std::nullopt;
+}
+
+} // namespace
+
+Failure unwritable(const std::vector<std::string>& paths)
+{
+    for (const std::string& path : paths) {
+        if (const std::optional<Failure> obstacle = obstacleToWriting(path))
+            return *obstacle;
+    }
+    return {paths.front(), "can't be written", "see whether the disk is full, or give another name"};
+}
+
+} // namespace cadrel::app
