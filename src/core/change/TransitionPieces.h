@@ -8,8 +8,8 @@ namespace cadrel::core {
 
 class EventList;
 
-/// Cuts the dissolves and wipes out of their events: each becomes a cut, and a piece of its own behind all events of
-/// the list bears the transition.
+/// Cuts the dissolves and wipes out of their events: each becomes a cut, and a piece of its own, after all events of
+/// the list, has the transition.
 ///
 ///     one event       |<-- D 024 -->|------ body ------|
 ///     two events      |---- piece --|                       dissolve, 24 frames

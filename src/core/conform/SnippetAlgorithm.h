@@ -6,12 +6,12 @@
 
 namespace cadrel::core {
 
-/// Moves the ends of each cut event around slivers, so that no few frames of an audio clip are left over. A short piece
+/// Moves the ends of each cut event around slivers, so that a few frames of a clip are never left over. A short piece
 /// outside the range comes along, and a short piece inside it stays out.
 ///
 ///     clip           |------------------------|
 ///     range     |------|                             the piece inside stays out
-///     range                |----------------|        the piece behind comes along, and what follows gives way
+///     range                |----------------|        the piece after it comes along, and what follows gives way
 ///
 /// When a range grows at its end, the following cuts give way. When it grows at its start, the preceding cut does not.
 /// This is deliberate.
