@@ -19,6 +19,10 @@ class EventBase;
 struct Framerate;
 class VfxNameMatcher;
 
+namespace fileio {
+class ParserInterface;
+} // namespace fileio
+
 struct ListKind {
     /// Change is also the kind of every temporary list.
     enum Type : std::int32_t { Old = 0, New = 1, Change = 2 };
@@ -95,12 +99,15 @@ public:
     void shiftSource(const Timecode& offset, bool forward) { shift(ListSide::Source, offset, forward); }
     void shiftDestination(const Timecode& offset, bool forward) { shift(ListSide::Destination, offset, forward); }
 
-    /// Reads a CMX EDL behind the present events, or in their place when not `append`. `framerate` receives the rate
+    /// Reads a file after the present events, or in their place when not `append`. `framerate` receives the rate
     /// that the file shows. `renameBRolls` gives a roll whose name without its last letter "B" is in the file that
     /// shorter name. Throws what the reader returns, Result::FileAccessFailed for a file that can't be read; the list
     /// stays cleared when not `append`.
     void load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
               bool acceptAudioChannels);
+    /// Reads after the present events with a parser of the caller, who can ask it then what else it found in the file.
+    void load(const std::wstring& fileName, Framerate& framerate, bool renameBRolls, bool acceptAudioChannels,
+              fileio::ParserInterface& parser);
     /// Without renaming B-rolls and without audio.
     void load(const std::wstring& fileName, bool append);
     /// Writes a CMX EDL, or several where there are more events than one file can hold; see fileio::CmxWriter. Throws
@@ -113,7 +120,7 @@ public:
     /// One notification, and none when nothing changed.
     void clearVfx();
 
-    /// Undoes earlier healing of the selected events and heals them anew by `healMode` (Settings::HealMode) against
+    /// Undoes earlier healing of the selected events and heals them anew by `healMode` (HealMode) against
     /// the inserts of `referenceList`. The list is sorted by DST IN and numbered from 1 afterwards, the healed events
     /// named by their order. Members of a healed event whose timecodes have become invalid are kept as they are. Throws
     /// what HealProcessing throws; no event is lost then.
