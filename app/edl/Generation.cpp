@@ -100,20 +100,17 @@ std::vector<std::string> inputsOf(const GenerationOptions& options)
     return inputs;
 }
 
-void configure(Settings& settings, const GenerationOptions& options)
+void configure(Settings& settings, const GivenSettings& given)
 {
-    if (options.matchBy)
-        settings.setMatchBy(*options.matchBy);
-    if (options.healMode)
-        settings.setHealMode(*options.healMode);
-    settings.setBRollRenaming(options.load.renameBRolls);
-    if (options.vfxPatterns.empty())
+    for (const auto& change : given.changes)
+        change(settings);
+    if (given.vfxPatterns.empty())
         return;
-    if (options.vfxPatterns.size() > Settings::VfxRowCount)
+    if (given.vfxPatterns.size() > Settings::VfxRowCount)
         throw UsageError{"--vfx: can be given " + std::to_string(Settings::VfxRowCount) + " times at most"};
     for (std::size_t row = 0; row < Settings::VfxRowCount; ++row)
         settings.setVfxPattern(
-            row < options.vfxPatterns.size() ? vfxPatternOf(options.vfxPatterns[row]) : VfxPatternEntry(), row);
+            row < given.vfxPatterns.size() ? vfxPatternOf(given.vfxPatterns[row]) : VfxPatternEntry(), row);
 }
 
 std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)
