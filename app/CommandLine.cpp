@@ -4,15 +4,16 @@
 
 #include "app/console/Failure.h"
 #include "app/console/JsonOutput.h"
+#include "app/settings/SettingsTable.h"
 #include "app/edl/ProjectFramerate.h"
 #include "core/settings/Settings.h"
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
-#include <array>
 #include <cstdint>
 #include <iterator>
 #include <string>
+#include <variant>
 #include <vector>
 
 namespace cadrel::app {
@@ -83,33 +84,6 @@ Examples:
 constexpr const char* EventsJsonHelp = "Also write the events as JSON; - is standard output";
 constexpr const char* AllJsonHelp = "Also write it all as JSON; - is standard output";
 
-/// The words of an option in the order of the numbers that they stand for.
-constexpr std::array<const char*, 2> MatchWords{"roll", "clip"};
-constexpr std::array<const char*, 4> HealWords{"none", "normal", "gaps", "inserts"};
-constexpr std::array<const char*, 2> TrackWords{"all", "selected"};
-static_assert(core::MatchBy::ClipName == 1 && core::HealMode::GapsWithInserts == 3 &&
-              core::ApplyTo::SelectedTracks == 1);
-
-/// A setting that is on or off: "--name" and "--no-name".
-struct Switch {
-    const char* name;
-    const char* help;
-    void (Settings::*set)(bool);
-};
-
-constexpr std::array Switches{
-    Switch{"destination-markers", "Mark each stretch that was carried over", &Settings::setCreateDestinationMarkers},
-    Switch{"insert-markers", "Mark new picture, which needs sound", &Settings::setCreateInsertMarkers},
-    Switch{"dissolve-wipe-markers", "Mark new dissolves and wipes", &Settings::setCreateDissolveWipeMarkers},
-    Switch{"automation-markers", "Mark jumps of the automation", &Settings::setCreateAutomationWarningMarkers},
-    Switch{"snippet-markers", "Mark slivers of clips at the ends of stretches",
-           &Settings::setCreateAudioSnippetMarkers},
-    Switch{"overlap-markers", "Mark stretches that want the same place of a track", &Settings::setCreateOverlapMarkers},
-    Switch{"virgin-territories", "Lead the automation over the stretches without old sound",
-           &Settings::setCreateVirginTerritories},
-    Switch{"b-roll", "Take A001B for a B-roll of A001", &Settings::setBRollRenaming},
-};
-
 template <typename Words>
 std::vector<std::string> wordList(const Words& words)
 {
@@ -161,35 +135,113 @@ void addLoadOptions(CLI::App& command, LoadOptions& load)
     addStrict(command, load);
 }
 
-/// An option whose word stands for a number.
-template <typename Words, typename Set>
-CLI::Option* addChoice(CLI::App& command, const char* name, const Words& words, Set set, const char* help)
-{
-    return command
-        .add_option_function<std::string>(
-            name, [&words, set](const std::string& word) { set(numberOf(word, words)); }, help)
-        ->check(CLI::IsMember(wordList(words)));
-}
+/// Adds the options of a setting to a command, by the kind of the setting, and gives the one that sets it. What the user
+/// wants goes to `given`.
+class SettingAdder {
+public:
+    SettingAdder(CLI::App& command, GivenSettings& given, const SettingEntry& entry)
+        : m_command(command), m_given(given), m_entry(entry)
+    {
+    }
 
-/// The options that say how a change EDL is made. Returns those that mean nothing when there already is one.
-std::vector<CLI::Option*> addMatching(CLI::App& command, GenerationOptions& generation)
-{
-    addChoice(
-        command, "--match", MatchWords, [&generation](std::int32_t number) { generation.matchBy = number; },
-        "The name that tells the same material: roll (default) or clip")
-        ->type_name("NAME");
-    CLI::Option* const heal =
-        addChoice(
-            command, "--heal", HealWords, [&generation](std::int32_t number) { generation.healMode = number; },
-            "How to join neighbours that keep their distance: none, normal (default), gaps or inserts")
-            ->type_name("MODE");
-    CLI::Option* const vfx =
-        command
-            .add_option("--vfx", generation.vfxPatterns,
-                        "The texts around the version number of VFX shots, * being any character; up to three times")
+    CLI::Option* operator()(const SwitchSetting& kind) const
+    {
+        return m_command
+            .add_flag_function(
+                option() + ",!" + offOption(),
+                [&given = m_given, kind](std::int64_t count) {
+                    given.changes.emplace_back(
+                        [kind, isOn = count > 0](Settings& settings) { settings.set(kind.option, isOn); });
+                },
+                m_entry.help)
+            ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+    }
+
+    CLI::Option* operator()(const ChoiceSetting& kind) const
+    {
+        return m_command
+            .add_option_function<std::string>(
+                option(),
+                [&given = m_given, kind](const std::string& word) {
+                    given.changes.emplace_back([kind, number = numberOf(word, kind.words)](Settings& settings) {
+                        settings.set(kind.option, number);
+                    });
+                },
+                m_entry.help)
+            ->check(CLI::IsMember(wordList(kind.words)))
+            ->type_name(kind.wordName);
+    }
+
+    CLI::Option* operator()(const FramesSetting& kind) const
+    {
+        return m_command
+            .add_option_function<std::int32_t>(
+                option(),
+                [&given = m_given, kind](std::int32_t frames) {
+                    given.changes.emplace_back(
+                        [kind, frames](Settings& settings) { settings.set(kind.option, frames); });
+                },
+                m_entry.help)
+            ->check(CLI::Range(0, MostFrames))
+            ->type_name("FRAMES");
+    }
+
+    template <typename Number>
+    CLI::Option* operator()(const BoundSetting<Number>& kind) const
+    {
+        CLI::Option* const bound = m_command
+                                       .add_option_function<Number>(
+                                           option(),
+                                           [&given = m_given, kind](Number number) {
+                                               given.changes.emplace_back([kind, number](Settings& settings) {
+                                                   settings.set(kind.isOn, true);
+                                                   settings.set(kind.bound, number);
+                                               });
+                                           },
+                                           m_entry.help)
+                                       ->check(CLI::Range(Number(0), kind.greatest))
+                                       ->type_name(kind.numberName);
+        addOff(kind.isOn, kind.offHelp)->excludes(bound);
+        return bound;
+    }
+
+    CLI::Option* operator()(const RangeSetting& kind) const
+    {
+        CLI::Option* const range =
+            m_command.add_option(option(), m_given.preserve, m_entry.help)->expected(2)->type_name("BEFORE AFTER");
+        addOff(&Settings::restrictRange, kind.offHelp)->excludes(range);
+        return range;
+    }
+
+    CLI::Option* operator()(const VfxSetting&) const
+    {
+        return m_command.add_option(option(), m_given.vfxPatterns, m_entry.help)
             ->type_name("PREFIX,POSTFIX")
             ->allow_extra_args(false);
-    return {heal, vfx};
+    }
+
+private:
+    std::string option() const { return std::string("--") + m_entry.name; }
+    std::string offOption() const { return std::string("--no-") + m_entry.name; }
+
+    CLI::Option* addOff(core::Option<bool> Settings::*isOn, const char* help) const
+    {
+        return m_command.add_flag_callback(
+            offOption(),
+            [&given = m_given, isOn] {
+                given.changes.emplace_back([isOn](Settings& settings) { settings.set(isOn, false); });
+            },
+            help);
+    }
+
+    CLI::App& m_command;
+    GivenSettings& m_given;
+    const SettingEntry& m_entry;
+};
+
+CLI::Option* addSetting(CLI::App& command, GivenSettings& given, const SettingEntry& entry)
+{
+    return std::visit(SettingAdder(command, given, entry), entry.kind);
 }
 
 CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
@@ -199,96 +251,13 @@ CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
     addFiles(*generate, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
     addOutput(*generate, "-o,--output", options.changeFile, "Where to write the change EDL");
     addOutput(*generate, "--json", options.jsonFile, EventsJsonHelp);
-    addMatching(*generate, options.generation);
+    for (const SettingEntry& entry : settingsTable()) {
+        if (entry.use != SettingEntry::Use::Run)
+            addSetting(*generate, options.generation.settings, entry);
+    }
     addLoadOptions(*generate, options.generation.load);
     generate->footer(GenerateHelp);
     return generate;
-}
-
-/// The options of a run that are numbers.
-void addNumbers(CLI::App& apply, ApplyOptions& options)
-{
-    const auto change = [&options](auto setting) { options.settings.push_back(setting); };
-    const CLI::Range frames(0, 10000);
-    addChoice(
-        apply, "--tracks", TrackWords,
-        [change](std::int32_t number) { change([number](Settings& settings) { settings.setApplyTo(number); }); },
-        "Which tracks to change: all (default) or those that are selected")
-        ->type_name("WHICH");
-    CLI::Option* const overhang = apply
-                                      .add_option_function<std::int32_t>(
-                                          "--overhang",
-                                          [change](std::int32_t threshold) {
-                                              change([threshold](Settings& settings) {
-                                                  settings.setIncludeOverhangingAudioEvents(true);
-                                                  settings.setSnippetThreshold(threshold);
-                                              });
-                                          },
-                                          "Let clips that hang over the end of a stretch by up to so many frames go "
-                                          "along with it whole or not at all")
-                                      ->check(frames)
-                                      ->type_name("FRAMES");
-    apply
-        .add_flag_callback(
-            "--no-overhang",
-            [change] { change([](Settings& settings) { settings.setIncludeOverhangingAudioEvents(false); }); },
-            "Cut clips exactly where their stretch ends (default)")
-        ->excludes(overhang);
-    CLI::Option* const share = apply
-                                   .add_option_function<double>(
-                                       "--overhang-percent",
-                                       [change](double percent) {
-                                           change([percent](Settings& settings) {
-                                               settings.setSnippetUsesPercentage(true);
-                                               settings.setSnippetMaxPercentage(percent);
-                                           });
-                                       },
-                                       "The largest part of a clip that counts as hanging over (default 50)")
-                                   ->check(CLI::Range(0.0, 100.0))
-                                   ->type_name("PERCENT");
-    apply
-        .add_flag_callback(
-            "--no-overhang-percent",
-            [change] { change([](Settings& settings) { settings.setSnippetUsesPercentage(false); }); },
-            "However much of the clip it is")
-        ->excludes(share);
-    apply
-        .add_option_function<std::int32_t>(
-            "--remains",
-            [change](std::int32_t threshold) {
-                change([threshold](Settings& settings) { settings.setRemainsThreshold(threshold); });
-            },
-            "The longest sliver that is marked as a snippet (default 5)")
-        ->check(frames)
-        ->type_name("FRAMES");
-}
-
-void addPreserve(CLI::App& apply, ApplyOptions& options)
-{
-    CLI::Option* const preserve =
-        apply
-            .add_option("--preserve", options.preserve,
-                        "Change the project between these two timecodes alone and keep what is before and after")
-            ->expected(2)
-            ->type_name("BEFORE AFTER");
-    apply
-        .add_flag_callback(
-            "--no-preserve",
-            [&options] { options.settings.push_back([](Settings& settings) { settings.setRestrictRange(false); }); },
-            "Change the whole project (default)")
-        ->excludes(preserve);
-}
-
-void addSwitches(CLI::App& apply, ApplyOptions& options)
-{
-    for (const Switch& entry : Switches) {
-        const std::string name = entry.name;
-        const auto change = [&options, set = entry.set](std::int64_t count) {
-            options.settings.push_back([set, isOn = count > 0](Settings& settings) { (settings.*set)(isOn); });
-        };
-        apply.add_flag_function("--" + name + ",!--no-" + name, change, entry.help)
-            ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
-    }
 }
 
 CLI::App* addApply(CLI::App& program, ApplyOptions& options)
@@ -311,11 +280,11 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
     addRate(*apply, options.generation.load, "Stop when the project has another frame rate");
     addStrict(*apply, options.generation.load);
     apply->option_defaults()->group("Settings, stored with the project");
-    for (CLI::Option* const option : addMatching(*apply, options.generation))
-        option->excludes(change);
-    addNumbers(*apply, options);
-    addPreserve(*apply, options);
-    addSwitches(*apply, options);
+    for (const SettingEntry& entry : settingsTable()) {
+        CLI::Option* const option = addSetting(*apply, options.generation.settings, entry);
+        if (entry.use == SettingEntry::Use::Generation)
+            option->excludes(change);
+    }
     apply->footer(ApplyHelp);
     return apply;
 }

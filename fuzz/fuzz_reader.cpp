@@ -41,6 +41,7 @@ void checkEvent(const core::EventBase& event)
 {
     check(event.eventKind() == core::EventKind::Plain, "the reader makes plain events");
     check(event.edlFileName() == "fuzz.edl", "an event knows its file");
+    check(event.sourceLine() > 0, "an event knows its line");
     check(!event.comment().empty() && event.comment()[0] >= '0' && event.comment()[0] <= '9',
           "an event line opens with a digit");
     check(event.transitionType() >= core::TransitionType::Cut && event.transitionType() <= core::TransitionType::Wipe,

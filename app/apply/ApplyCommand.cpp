@@ -86,15 +86,13 @@ double secondsOf(const std::string& text)
     return isNegative ? -timecode->toSeconds() : timecode->toSeconds();
 }
 
-/// Puts the changes that the user wants into the settings of the project.
-void configure(Settings& settings, const ApplyOptions& options)
+/// Puts the stretch that may change into the settings, where the user gave one. Throws UsageError.
+void restrictRange(Settings& settings, const std::vector<std::string>& preserve)
 {
-    for (const auto& change : options.settings)
-        change(settings);
-    if (options.preserve.empty())
+    if (preserve.empty())
         return;
-    const double before = secondsOf(options.preserve[0]);
-    const double after = secondsOf(options.preserve[1]);
+    const double before = secondsOf(preserve[0]);
+    const double after = secondsOf(preserve[1]);
     if (!(before < after))
         throw UsageError{"--preserve: the second timecode has to be after the first"};
     settings.setRestrictRange(true);
@@ -116,7 +114,6 @@ ChangeSource fillChangeList(DataModel& model, const ApplyOptions& options, Termi
     GenerationOptions generation = options.generation;
     generation.load.renameBRolls = model.settings().bRollRenaming();
     generation.load.rateAdvice = "check the file and the frame rate of the project";
-    configure(model.settings(), generation);
     if (options.changeFiles.empty())
         return {generateChangeEdl(model, generation, terminal), {}};
     generation.load.acceptAudio = true;
@@ -250,13 +247,14 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
 {
     checkOutputs(options);
     Settings trial; // so that wrong usage is told at once
-    configure(trial, options.generation);
+    configure(trial, options.generation.settings);
 
     terminal.showProgress("reading " + fileNameOf(options.projectFile));
     HostedProject hosted(options.projectFile, terminal);
     const ProjectClock clock = clockOf(hosted.project(), options.projectFile);
     requireRate(options, clock);
-    configure(hosted.model().settings(), options);
+    configure(hosted.model().settings(), options.generation.settings);
+    restrictRange(hosted.model().settings(), options.generation.settings.preserve);
     const ChangeSource source = fillChangeList(hosted.model(), options, terminal);
     ApplyFacts facts = factsOf(hosted, source, options);
 

@@ -4,13 +4,8 @@
 
 #include "app/edl/Generation.h"
 
-#include <functional>
 #include <string>
 #include <vector>
-
-namespace cadrel::core {
-class Settings;
-} // namespace cadrel::core
 
 namespace cadrel::app {
 
@@ -24,10 +19,6 @@ struct ApplyOptions {
     std::string jsonFile;                 ///< empty: none is written; "-": standard output
     bool inPlace = false;                 ///< the result replaces the project
     bool summary = false;                 ///< the totals alone
-    /// The changes that the user wants to the project's settings, in the order of the options.
-    std::vector<std::function<void(core::Settings&)>> settings;
-    /// The timecodes between which the project changes; none: what the settings say.
-    std::vector<std::string> preserve;
 };
 
 /// `cadrel apply`: carries a sound project over to a new cut. The files appear together when all has gone well, or not

@@ -4,10 +4,10 @@
 
 #include "app/console/Columns.h"
 #include "app/console/Printable.h"
+#include "app/settings/SettingsTable.h"
 #include "app/console/Wording.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
-#include "core/settings/Settings.h"
 
 #include <algorithm>
 #include <array>
@@ -19,7 +19,6 @@
 
 namespace cadrel::app {
 
-using core::Settings;
 using standin::Track;
 
 namespace {
@@ -47,38 +46,6 @@ std::string secondsText(double seconds)
     std::array<char, 32> text{};
     std::snprintf(text.data(), text.size(), "%.1f s", seconds);
     return text.data();
-}
-
-/// The settings that aren't the default.
-std::vector<std::string> unusualSettings(const Settings& settings, const ProjectClock& clock, double origin)
-{
-    std::vector<std::string> words;
-    const auto add = [&words](bool isUnusual, const std::string& what) {
-        if (isUnusual)
-            words.push_back(what);
-    };
-    const auto frames = [](std::int32_t count) {
-        return counted(static_cast<std::size_t>(std::max(count, 0)), "frame");
-    };
-    const Settings usual;
-    add(settings.applyTo() != usual.applyTo(), "selected tracks alone");
-    add(settings.matchBy() != usual.matchBy(), "matched by clip name");
-    add(settings.includeOverhangingAudioEvents(),
-        "overhangs up to " + frames(settings.snippetThreshold()) + " go along");
-    add(settings.remainsThreshold() != usual.remainsThreshold(),
-        "snippets up to " + frames(settings.remainsThreshold()));
-    add(settings.createVirginTerritories(), "virgin territories");
-    add(settings.restrictRange(), "between " + clock.exactTimecode(settings.preserveMaterialBefore() - origin) +
-                                      " and " + clock.exactTimecode(settings.preserveMaterialAfter() - origin) +
-                                      " alone");
-    add(!settings.createDestinationMarkers(), "no destination markers");
-    add(!settings.createInsertMarkers(), "no insert markers");
-    add(!settings.createDissolveWipeMarkers(), "no dissolve and wipe markers");
-    add(!settings.createAutomationWarningMarkers(), "no automation markers");
-    add(!settings.createAudioSnippetMarkers(), "no snippet markers");
-    add(!settings.createOverlapMarkers(), "no overlap markers");
-    add(!settings.bRollRenaming(), "no B-rolls");
-    return words;
 }
 
 std::string nameOf(const Placement& placement)
@@ -185,7 +152,8 @@ void ApplyListing::printTotals(std::ostream& out) const
     else
         out << "Frame rate  " << rate << '\n'
             << "Change EDL  " << describeEvents(model.changeEdl(), m_facts.changeNames) << '\n';
-    const std::vector<std::string> settings = unusualSettings(model.settings(), m_clock, m_facts.timeOrigin);
+    const auto timeText = [this](double seconds) { return m_clock.exactTimecode(seconds - m_facts.timeOrigin); };
+    const std::vector<std::string> settings = unusualSettings(model.settings(), timeText);
     if (!settings.empty())
         out << "Settings    " << joined(settings) << '\n';
     out << "Applied     " << counted(m_facts.appliedCount(), "event") << " in " << secondsText(m_facts.seconds) << '\n';

@@ -9,15 +9,13 @@
 #include "app/console/Wording.h"
 #include "app/edl/ProjectFramerate.h"
 #include "core/edl/EventBase.h"
-#include "core/fileio/CmxParser.h"
+#include "core/fileio/ParserChoice.h"
+#include "core/fileio/ParserInterface.h"
 #include "core/time/Timecode.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
-#include <fstream>
-#include <functional>
-#include <string_view>
 
 namespace cadrel::app {
 
@@ -25,6 +23,8 @@ using core::EventBase;
 using core::EventFlaw;
 using core::Framerate;
 using core::Timecode;
+using core::fileio::parserFor;
+using core::fileio::SourceLine;
 using util::Result;
 using util::StringUtil;
 
@@ -33,32 +33,16 @@ namespace {
 /// A line of a file, shown in a message.
 constexpr std::size_t MostCharactersOfALine = 120;
 
-std::string firstLineOf(const EventBase& event)
+/// The line that an event was read from.
+SourceLine lineOf(const EventBase& event)
 {
-    return event.comment().substr(0, event.comment().find('\n'));
+    return {event.sourceLine(), event.comment().substr(0, event.comment().find('\n'))};
 }
 
-/// The first line of the file that passes the test, as `line 12: "001 AX ..."`; empty when there is none.
-std::string quoteLine(const std::string& path, const std::function<bool(std::string_view)>& test)
+/// `line 12: "001 AX ..."`.
+std::string quoted(const SourceLine& line)
 {
-    std::ifstream file(path, std::ios::binary);
-    const std::string content((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
-    std::string_view rest = content;
-    for (std::size_t number = 1; !rest.empty(); ++number) {
-        const std::size_t end = std::min(rest.find_first_of("\r\n"), rest.size());
-        const std::string_view line = StringUtil::trimView(rest.substr(0, end));
-        if (test(line))
-            return "line " + std::to_string(number) + ": \"" + toPrintable(line, MostCharactersOfALine).text + "\"";
-        rest.remove_prefix(end);
-        rest.remove_prefix(rest.starts_with("\r\n") ? 2 : std::min<std::size_t>(rest.size(), 1));
-    }
-    return {};
-}
-
-bool saysDropFrame(std::string_view line)
-{
-    return line.starts_with("FCM") && line.find("DROP FRAME") != std::string_view::npos &&
-           line.find("NON-DROP FRAME") == std::string_view::npos;
+    return "line " + std::to_string(line.number) + ": \"" + toPrintable(line.text, MostCharactersOfALine).text + "\"";
 }
 
 /// Whether a frames field of the event is beyond the rate.
@@ -75,13 +59,14 @@ Framerate EdlLoader::chooseRate(const std::string& firstFile) const
     if (!m_options.rateLabel.empty())
         return Framerate::fromLabel(m_options.rateLabel);
     Framerate shown;
-    if (core::fileio::CmxParser().detect(toWide(firstFile), shown) != Result::Ok)
+    const std::wstring path = toWide(firstFile);
+    if (parserFor(path)->detect(path, shown) != Result::Ok)
         throw unreadable(firstFile);
     if (const auto framerate = ProjectFramerate::fromShownRate(shown))
         return *framerate;
     // A file without anything readable needs different advice. At 60 frames a second every timecode can be read.
     const ProjectFramerate anyRate(Framerate(60, 0));
-    LoadedEdl edl{firstFile, core::EventList(), {}};
+    LoadedEdl edl{firstFile, core::EventList(), {}, {}};
     load(edl);
     refuseUnreadable(edl);
     throw Failure{firstFile, "shows no frame rate", "give it with --rate, such as --rate \"24 fps\""};
@@ -116,7 +101,9 @@ void EdlLoader::load(LoadedEdl& edl) const
     const std::wstring path = toWide(edl.path);
     m_terminal.showProgress("reading " + fileNameOf(edl.path));
     try {
-        edl.events.load(path, true, edl.shown, m_options.renameBRolls, m_options.acceptAudio);
+        const auto parser = parserFor(path);
+        edl.events.load(path, edl.shown, m_options.renameBRolls, m_options.acceptAudio, *parser);
+        edl.rateLine = parser->rateLine();
     } catch (const Result::Type&) {
         throw unreadable(edl.path);
     }
@@ -136,14 +123,12 @@ void EdlLoader::checkRate(const LoadedEdl& edl) const
     if (!faster && first == events.end())
         return;
 
-    const std::string where =
-        first == events.end() ? quoteLine(edl.path, saysDropFrame)
-                              : quoteLine(edl.path, [text = firstLineOf(**first)](auto line) { return line == text; });
+    const std::optional<SourceLine> where = first == events.end() ? edl.rateLine : lineOf(**first);
     const std::string what =
         faster
             ? "shows " + std::to_string(edl.shown.framesPerSecond) + " fps, more than the " + label + " of the project"
             : counted(edl.events.countInvalidTimecodes(), "event") + " with timecodes that don't exist at " + label;
-    const Failure failure{edl.path, where.empty() ? what : what + ", first in " + where, m_options.rateAdvice};
+    const Failure failure{edl.path, where ? what + ", first in " + quoted(*where) : what, m_options.rateAdvice};
     if (m_options.strict)
         throw failure;
     m_terminal.warn(failure);

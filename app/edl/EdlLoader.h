@@ -3,9 +3,11 @@
 #pragma once
 
 #include "core/edl/EventList.h"
+#include "core/fileio/SourceLine.h"
 #include "core/time/Framerate.h"
 
 #include <list>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -25,7 +27,8 @@ struct LoadOptions {
 struct LoadedEdl {
     std::string path;
     core::EventList events;
-    core::Framerate shown; ///< the rate that the file shows; may be unknown
+    core::Framerate shown;                            ///< the rate that the file shows; may be unknown
+    std::optional<core::fileio::SourceLine> rateLine; ///< the line that says so; nothing where only timecodes show it
 };
 
 /// Reads EDL files one by one, each into a list of its own, and warns of those that don't fit the project's rate.

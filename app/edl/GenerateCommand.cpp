@@ -85,7 +85,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
 
     // Deleting long lists event by event takes a while; the end of the program frees them at once.
     static DataModel& model = *new DataModel;
-    configure(model.settings(), options.generation);
+    configure(model.settings(), options.generation.settings);
     const ProjectFramerate framerate(
         EdlLoader(options.generation.load, terminal).chooseRate(options.generation.oldFiles.front()));
     const std::string rate = ProjectFramerate::labelOf(framerate.getFramerate());

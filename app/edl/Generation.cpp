@@ -6,7 +6,7 @@
 #include "app/console/Paths.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
-#include "app/edl/GenerationFailure.h"
+#include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/settings/VfxNameMatcher.h"
 #include "util/Result.h"
@@ -18,6 +18,7 @@ namespace cadrel::app {
 using core::DataModel;
 using core::EventBase;
 using core::EventList;
+using core::GenerationFailure;
 using core::Settings;
 using core::VfxNameMatcher;
 using core::VfxPatternEntry;
@@ -54,16 +55,16 @@ std::string reasonFor(Result::Type result)
     }
 }
 
-/// "event 005 of reel3.edl (A012C004)".
+/// "event 5 in line 12 of reel3.edl (A012C004)".
 std::string nameOf(const EventBase& event)
 {
-    return "event " + std::to_string(event.eventNumber()) + " of " + event.edlFileName() + " (" + event.rollName() +
-           ")";
+    return "event " + std::to_string(event.eventNumber()) + " in line " + std::to_string(event.sourceLine()) + " of " +
+           event.edlFileName() + " (" + event.rollName() + ")";
 }
 
-Failure failureOf(const DataModel& model, Result::Type result, const GenerationOptions& options)
+Failure failureOf(const GenerationFailure& failed, Result::Type result, const GenerationOptions& options)
 {
-    const auto [newEvent, oldEvent] = findGenerationFailure(model);
+    const auto& [oldEvent, newEvent] = failed;
     const std::string reason = ": " + reasonFor(result);
     const std::string remedy = "correct its timecodes or leave it out";
     if (newEvent != nullptr && oldEvent != nullptr)
@@ -80,11 +81,10 @@ Failure failureOf(const DataModel& model, Result::Type result, const GenerationO
 void generate(DataModel& model, const GenerationOptions& options, Terminal& terminal)
 {
     terminal.showProgress("generating the change EDL");
-    const Result::Type result = model.generateChangeEdl();
-    if (result != Result::Ok) {
-        terminal.showProgress("looking for the event on which it fails");
-        throw failureOf(model, result, options);
-    }
+    GenerationFailure failed;
+    const Result::Type result = model.generateChangeEdl([&](const GenerationFailure& failure) { failed = failure; });
+    if (result != Result::Ok)
+        throw failureOf(failed, result, options);
     if (model.changeEdl().isEmpty())
         throw Failure{joined(inputsOf(options)),
                       "nothing of the old cut survives in the new one, so there is no change EDL",
@@ -100,20 +100,17 @@ std::vector<std::string> inputsOf(const GenerationOptions& options)
     return inputs;
 }
 
-void configure(Settings& settings, const GenerationOptions& options)
+void configure(Settings& settings, const GivenSettings& given)
 {
-    if (options.matchBy)
-        settings.setMatchBy(*options.matchBy);
-    if (options.healMode)
-        settings.setHealMode(*options.healMode);
-    settings.setBRollRenaming(options.load.renameBRolls);
-    if (options.vfxPatterns.empty())
+    for (const auto& change : given.changes)
+        change(settings);
+    if (given.vfxPatterns.empty())
         return;
-    if (options.vfxPatterns.size() > Settings::VfxRowCount)
+    if (given.vfxPatterns.size() > Settings::VfxRowCount)
         throw UsageError{"--vfx: can be given " + std::to_string(Settings::VfxRowCount) + " times at most"};
     for (std::size_t row = 0; row < Settings::VfxRowCount; ++row)
         settings.setVfxPattern(
-            row < options.vfxPatterns.size() ? vfxPatternOf(options.vfxPatterns[row]) : VfxPatternEntry(), row);
+            row < given.vfxPatterns.size() ? vfxPatternOf(given.vfxPatterns[row]) : VfxPatternEntry(), row);
 }
 
 std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)

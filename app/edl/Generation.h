@@ -2,10 +2,9 @@
 
 #pragma once
 
+#include "app/settings/SettingsTable.h"
 #include "app/edl/EdlLoader.h"
 
-#include <cstdint>
-#include <optional>
 #include <string>
 #include <vector>
 
@@ -23,9 +22,7 @@ struct GenerationOptions {
     std::vector<std::string> oldFiles;
     std::vector<std::string> newFiles;
     LoadOptions load;
-    std::optional<std::int32_t> matchBy; ///< nothing: what the settings of the model say, here and for the healing
-    std::optional<std::int32_t> healMode;
-    std::vector<std::string> vfxPatterns; ///< "PREFIX,POSTFIX"; none: those of the settings
+    GivenSettings settings;
 };
 
 /// The names of the files that were read.
@@ -37,8 +34,9 @@ struct Cuts {
 /// The files of both cuts.
 std::vector<std::string> inputsOf(const GenerationOptions& options);
 
-/// Puts the options into the settings. Throws UsageError for an invalid VFX pattern.
-void configure(core::Settings& settings, const GenerationOptions& options);
+/// Puts what the user gave into the settings, but for the stretch to preserve. Throws UsageError for a VFX pattern that
+/// can't be one.
+void configure(core::Settings& settings, const GivenSettings& given);
 
 /// Puts the events of the files into the list; returns the names of the files. Throws Failure.
 std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files,

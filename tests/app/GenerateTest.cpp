@@ -357,7 +357,8 @@ TEST(Generate, AFailureNamesBothEventsThatCantBeMatched)
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.out, "");
     EXPECT_EQ(outcome.err,
-              "cadrel: new.edl: event 3 of new.edl (A009) can't be matched with event 3 of old.edl (A009): "
+              "cadrel: new.edl: event 3 in line 2 of new.edl (A009) can't be matched with event 3 in line 3 of old.edl "
+              "(A009): "
               "a time would fall outside the 24 hours of a day; correct its timecodes or leave it out\n");
     EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
 }
@@ -373,8 +374,8 @@ TEST(Generate, AFailureNamesTheEventThatCantBeUsed)
 
     const std::string reason = " (A009) can't be used: a time would fall outside the 24 hours of a day; "
                                "correct its timecodes or leave it out\n";
-    EXPECT_EQ(inOld.generate().err, "cadrel: old.edl: event 2 of old.edl" + reason);
-    EXPECT_EQ(inNew.generate().err, "cadrel: new.edl: event 2 of new.edl" + reason);
+    EXPECT_EQ(inOld.generate().err, "cadrel: old.edl: event 2 in line 2 of old.edl" + reason);
+    EXPECT_EQ(inNew.generate().err, "cadrel: new.edl: event 2 in line 2 of new.edl" + reason);
 }
 
 TEST(Generate, WarningsNameTheFileAndStrictStops)

@@ -5,11 +5,14 @@
 #include "core/change/PlacementChoice.h"
 #include "core/change/SharedStretch.h"
 #include "core/edl/EventBase.h"
+#include "util/Result.h"
 
 #include <cstdint>
 #include <memory>
 
 namespace cadrel::core {
+
+using util::Result;
 
 namespace {
 
@@ -42,19 +45,27 @@ ChangeCandidate makeCandidate(const Placement& placement, const EventBase& newEv
 
 } // namespace
 
-void CandidateSearch::addOldEvent(const std::string& name, const EventBase& event)
+void CandidateSearch::addOldEvent(const std::string& name, const EventBase& event, std::size_t index)
 {
-    m_index.add(name, EventShape(event, m_framerate), m_oldEventCount++);
+    m_index.add(name, EventShape(event, m_framerate), index);
 }
 
-std::vector<ChangeCandidate> CandidateSearch::survivingCandidates(const std::string& name, const EventBase& newEvent,
-                                                                  double lastDisplacement) const
+std::vector<ChangeCandidate>
+CandidateSearch::survivingCandidates(const std::string& name, const EventBase& newEvent, double lastDisplacement,
+                                     const std::function<void(std::size_t)>& onFailure) const
 {
     const EventShape shape(newEvent, m_framerate);
     std::vector<SharedStretch> stretches;
     for (const TwinGroup* group : m_index.groupsOverlapping(name, shape.srcIn, shape.srcOut)) {
-        if (group->shape.isPlayedLike(shape))
+        if (!group->shape.isPlayedLike(shape))
+            continue;
+        try {
             stretches.emplace_back(*group, shape, m_framerate);
+        } catch (Result::Type) {
+            // The latest place leaves the day first.
+            onFailure(group->placesByTime.back().index);
+            throw;
+        }
     }
     std::vector<ChangeCandidate> candidates;
     for (const Placement& placement : survivingPlacements(stretches, lastDisplacement))

@@ -7,6 +7,7 @@
 #include "core/time/Framerate.h"
 
 #include <cstddef>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -24,22 +25,23 @@ class CandidateSearch {
 public:
     explicit CandidateSearch(const Framerate& framerate) : m_framerate(framerate) {}
 
-    /// Adds a valid event of the old list, in the order of the list, under the name that it is compared by. Throws what
-    /// Timecode::toFrameCount throws for a timecode that isn't valid at the rate.
-    void addOldEvent(const std::string& name, const EventBase& event);
+    /// Adds the valid event at `index` of the old list under the name that it is compared by. The events come in the
+    /// order of the list. Throws what Timecode::toFrameCount throws for a timecode that isn't valid at the rate.
+    void addOldEvent(const std::string& name, const EventBase& event, std::size_t index);
     /// Call it after all events have been added and before the first search.
     void finish() { m_index.finish(); }
 
     /// The candidates that survive for a valid new event, in the order of the old events. `lastDisplacement` is that of
     /// the previous placement, in seconds: among candidates of the same length, the one whose displacement is nearest
-    /// to it survives. Throws Result::OutOfRange when a candidate leaves the day, even if it wouldn't survive.
+    /// to it survives. Throws Result::OutOfRange when a candidate leaves the day, even if it wouldn't survive. Before
+    /// that, `onFailure` gets the index of its old event.
     std::vector<ChangeCandidate> survivingCandidates(const std::string& name, const EventBase& newEvent,
-                                                     double lastDisplacement) const;
+                                                     double lastDisplacement,
+                                                     const std::function<void(std::size_t)>& onFailure) const;
 
 private:
     Framerate m_framerate;
     MaterialIndex m_index;
-    std::size_t m_oldEventCount = 0;
 };
 
 } // namespace cadrel::core

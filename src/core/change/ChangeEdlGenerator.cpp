@@ -9,12 +9,49 @@
 #include "core/edl/EventList.h"
 #include "core/edl/MatchedName.h"
 
+#include <algorithm>
 #include <memory>
 #include <utility>
 
 namespace cadrel::core {
 
 using util::Result;
+
+namespace {
+
+/// A copy of a list, behind whose events stand the transitions as events of their own. It knows which event of the list
+/// each of them comes from.
+class WorkingList {
+public:
+    explicit WorkingList(const EventList& given) : m_given(given) { m_events.copyFrom(given); }
+
+    /// Before it throws, it gives `onFailure` the event that it fails on.
+    template <typename OnFailure>
+    void expand(OnFailure onFailure)
+    {
+        m_origins = expandTransitions(m_events, [&](std::size_t index) { onFailure(m_given.eventAt(index)); });
+    }
+
+    const EventList& events() const { return m_events; }
+
+    std::shared_ptr<EventBase> originAt(std::size_t index) const
+    {
+        return m_given.eventAt(index < m_given.size() ? index : m_origins[index - m_given.size()]);
+    }
+
+    std::shared_ptr<EventBase> originOf(const std::shared_ptr<EventBase>& event) const
+    {
+        const auto& events = m_events.events();
+        return originAt(static_cast<std::size_t>(std::find(events.begin(), events.end(), event) - events.begin()));
+    }
+
+private:
+    const EventList& m_given;
+    EventList m_events;
+    std::vector<std::size_t> m_origins; ///< of the pieces: the index of the event
+};
+
+} // namespace
 
 void ChangeEdlGenerator::configure(std::int32_t matchBy, const std::vector<VfxPatternEntry>& vfxEntries)
 {
@@ -33,23 +70,28 @@ ChangeEdlGenerator::ComparisonName ChangeEdlGenerator::comparisonName(const Even
 Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const EventList& newEvents,
                                           EventList& changeEvents) const
 {
-    changeEvents.clear();
-    EventList oldWork;
-    EventList newWork;
-    oldWork.copyFrom(oldEvents);
-    newWork.copyFrom(newEvents);
-    expandTransitions(oldWork);
-    expandTransitions(newWork);
+    return generate(oldEvents, newEvents, changeEvents, [](const GenerationFailure&) {});
+}
 
+Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const EventList& newEvents,
+                                          EventList& changeEvents, const GenerationFailureListener& onFailure) const
+{
+    changeEvents.clear();
     const Framerate framerate = Timecode::framerate();
+    WorkingList oldWork(oldEvents);
+    WorkingList newWork(newEvents);
+    oldWork.expand([&](const std::shared_ptr<EventBase>& oldEvent) { onFailure({oldEvent, nullptr}); });
+    newWork.expand([&](const std::shared_ptr<EventBase>& newEvent) { onFailure({nullptr, newEvent}); });
+
     CandidateSearch search(framerate);
-    for (const auto& event : oldWork.events()) {
-        if (event->isValid())
-            search.addOldEvent(comparisonName(*event).key, *event);
+    for (std::size_t index = 0; index < oldWork.events().size(); ++index) {
+        const EventBase& event = oldWork.events().at(index);
+        if (event.isValid())
+            search.addOldEvent(comparisonName(event).key, event, index);
     }
     search.finish();
 
-    const CutMap newProgramme(newWork, framerate);
+    const CutMap newProgramme(newWork.events(), framerate);
     double lastDisplacement = 0.0;
     std::uint32_t number = 1;
     for (const CutEntry& entry : newProgramme.dstInOrder()) {
@@ -58,7 +100,10 @@ Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const Even
             continue;
         const auto [key, isVfx] = comparisonName(*newEvent);
         newEvent->setVfx(isVfx);
-        for (const ChangeCandidate& survivor : search.survivingCandidates(key, *newEvent, lastDisplacement)) {
+        const auto fail = [&](std::size_t oldIndex) {
+            onFailure({oldWork.originAt(oldIndex), newWork.originOf(newEvent)});
+        };
+        for (const ChangeCandidate& survivor : search.survivingCandidates(key, *newEvent, lastDisplacement, fail)) {
             survivor.changeEvent->setEventNumber(number++);
             changeEvents.add(survivor.changeEvent);
             lastDisplacement = survivor.displacement;

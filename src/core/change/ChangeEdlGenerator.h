@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "core/change/GenerationFailure.h"
 #include "core/settings/VfxNameMatcher.h"
 #include "util/Result.h"
 
@@ -38,6 +39,9 @@ public:
     /// Replaces the content of `changeEvents`; the inputs stay as they are. Returns Ok. Throws what the timecode
     /// arithmetic throws for a valid event, and Result::OutOfRange for a stretch that leaves the day.
     util::Result::Type generate(const EventList& oldEvents, const EventList& newEvents, EventList& changeEvents) const;
+    /// Likewise, and tells `onFailure` of the events before it throws on their account.
+    util::Result::Type generate(const EventList& oldEvents, const EventList& newEvents, EventList& changeEvents,
+                                const GenerationFailureListener& onFailure) const;
 
 private:
     struct ComparisonName {

@@ -66,21 +66,26 @@ std::shared_ptr<EventBase> cutOutTransition(EventBase& event, const EventBase* b
 
 } // namespace
 
-void expandTransitions(EventList& events)
+std::vector<std::size_t> expandTransitions(EventList& events, const std::function<void(std::size_t)>& onFailure)
 {
     EventList pieces;
+    std::vector<std::size_t> origins;
     for (std::size_t index = 0; index < events.size(); ++index) {
         EventBase& event = events.at(index);
         if (!event.isTransition())
             continue;
         try {
             pieces.add(cutOutTransition(event, index > 0 ? &events.at(index - 1) : nullptr));
+            origins.push_back(index);
         } catch (Result::Type) {
-            if (event.isValid())
+            if (event.isValid()) {
+                onFailure(index);
                 throw;
+            }
         }
     }
     events.append(pieces);
+    return origins;
 }
 
 void mergeTransitionPieces(EventList& changeEvents, std::int32_t matchBy)

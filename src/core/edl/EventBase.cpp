@@ -74,6 +74,7 @@ EventBase& EventBase::operator=(const EventBase& other)
     m_edlFileName = other.m_edlFileName;
     m_comment = other.m_comment;
     m_vfx = other.m_vfx;
+    m_sourceLine = other.m_sourceLine;
     m_motionSpeed = other.m_motionSpeed;
     m_changeContext = other.m_changeContext;
     return *this;
@@ -341,6 +342,7 @@ void EventBase::readFields(ByteArchive& archive, std::uint32_t version)
     if (version == 0)
         archive >> m_flawText;
     archive >> m_vfx;
+    m_sourceLine = 0;
 }
 
 void EventBase::finishReading()

@@ -56,8 +56,8 @@ struct TransitionType {
 ///
 /// The getters return references, which change with the event. Copy a value that you need after a setter.
 ///
-/// Every setter notifies with the event's own context after the change, except setEventNumber, setComment, addFlaw and
-/// removeFlaw, which are called in bulk or before anyone listens.
+/// Every setter notifies with the event's own context after the change, except setEventNumber, setComment,
+/// setSourceLine, addFlaw and removeFlaw, which are called in bulk or before anyone listens.
 class EventBase : public serialize::Serializable, public ChangeContextNotificationBase {
 public:
     /// An event that has only flaw 0.
@@ -66,7 +66,7 @@ public:
     EventBase(const EventBase& other);
     /// Copies everything but the listeners and the text of flaw 1, without a notification and without working out the
     /// flaws again. The timecodes then count as initialized, but flaw 0 stays in a copied set until the next change of
-    /// a timecode. This is deliberate.
+    /// a timecode. This is deliberate: a copy has the flaws of its source until someone edits it.
     EventBase& operator=(const EventBase& other);
     ~EventBase() override = default;
 
@@ -91,6 +91,9 @@ public:
     const std::string& reservedText() const { return m_reservedText; }
     const std::string& edlFileName() const { return m_edlFileName; }
     const std::string& comment() const { return m_comment; }
+    /// The number of the line of the file edlFileName() that the event was read from, counted from 1; 0 for an event that
+    /// was read from no list. Copied like the other fields, not stored, and 0 after the event is read from an archive.
+    std::uint32_t sourceLine() const { return m_sourceLine; }
     bool vfx() const { return m_vfx; }
     /// Source duration over destination duration; 0 for a freeze frame.
     double motionSpeed() const { return m_motionSpeed; }
@@ -131,6 +134,7 @@ public:
 
     void setEventNumber(std::uint32_t number) { m_eventNumber = number; }
     void setComment(const std::string& text);
+    void setSourceLine(std::uint32_t number) { m_sourceLine = number; }
     void addFlaw(std::int32_t flaw);
     void removeFlaw(std::int32_t flaw);
 
@@ -174,6 +178,7 @@ private:
     std::string m_edlFileName;
     std::string m_comment;
     bool m_vfx = false;
+    std::uint32_t m_sourceLine = 0;
     double m_motionSpeed = 1.0;
     EventChangeContext m_changeContext;
     std::string m_flawText;

@@ -19,6 +19,10 @@ class EventBase;
 struct Framerate;
 class VfxNameMatcher;
 
+namespace fileio {
+class ParserInterface;
+} // namespace fileio
+
 struct ListKind {
     /// Change is also the kind of every temporary list.
     enum Type : std::int32_t { Old = 0, New = 1, Change = 2 };
@@ -95,12 +99,15 @@ public:
     void shiftSource(const Timecode& offset, bool forward) { shift(ListSide::Source, offset, forward); }
     void shiftDestination(const Timecode& offset, bool forward) { shift(ListSide::Destination, offset, forward); }
 
-    /// Reads a CMX EDL. Its events come after the present ones with `append`, otherwise they replace them. `framerate`
+    /// Reads an EDL. Its events come after the present ones with `append`, otherwise they replace them. `framerate`
     /// receives the rate that the file shows. With `renameBRolls`, a roll "A001B" is named "A001" when the file also
     /// has a roll "A001". Throws what the reader returns, such as Result::FileAccessFailed for a file that can't be
     /// read; without `append` the list is empty then.
     void load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
               bool acceptAudioChannels);
+    /// Reads after the present events with a parser of the caller, who can ask it then what else it found in the file.
+    void load(const std::wstring& fileName, Framerate& framerate, bool renameBRolls, bool acceptAudioChannels,
+              fileio::ParserInterface& parser);
     /// Without renaming B-rolls and without audio.
     void load(const std::wstring& fileName, bool append);
     /// Writes a CMX EDL, or several if there are more events than one file can hold; see fileio::CmxWriter. Throws what

@@ -139,9 +139,10 @@ try {
     EventCollector collector;
     readLines(
         path,
-        [&](std::string_view line) {
+        [&](std::string_view line, std::uint32_t lineNumber) {
             EventBase& event = collector.begin();
             event.setEdlFileName(fileName);
+            event.setSourceLine(lineNumber);
             if (parseEventLine(line, acceptAudio, event))
                 collector.accept(line);
         },
@@ -157,7 +158,7 @@ Result::Type CmxParser::detect(const std::wstring& path, Framerate& framerate)
 try {
     readLines(
         path,
-        [&](std::string_view line) {
+        [&](std::string_view line, std::uint32_t) {
             const EventLine columns(line);
             for (std::size_t index = 0; index < columns.timecodeCount; ++index)
                 parseTimecode(columns.timecodes[index]);
@@ -167,6 +168,18 @@ try {
     return Result::Ok;
 } catch (Result::Type failure) {
     return failure;
+}
+
+bool CmxParser::recognises(std::string_view) const
+{
+    return true;
+}
+
+std::optional<SourceLine> CmxParser::rateLine() const
+{
+    if (m_dropFrameState != 1)
+        return std::nullopt;
+    return m_frameCountModeLine;
 }
 
 Framerate CmxParser::detectedFramerate() const
@@ -195,20 +208,22 @@ void CmxParser::readLines(const std::wstring& path, EventLineAction onEventLine,
         if (line->empty())
             continue;
         if (line->starts_with("FCM"))
-            readFrameCountMode(*line);
+            readFrameCountMode(reader, *line);
         else if (isDigit(line->front()))
-            onEventLine(*line);
+            onEventLine(*line, reader.lineNumber());
         else if (line->front() == '*')
             onComment(*line);
     }
 }
 
-void CmxParser::readFrameCountMode(std::string_view line)
+void CmxParser::readFrameCountMode(const LineReader& reader, std::string_view line)
 {
-    if (contains(line, "NON-DROP FRAME"))
-        m_dropFrameState = 0;
-    else if (contains(line, "DROP FRAME"))
-        m_dropFrameState = 1;
+    if (!contains(line, "DROP FRAME"))
+        return;
+    const std::int32_t state = contains(line, "NON-DROP FRAME") ? 0 : 1;
+    if (state != m_dropFrameState)
+        m_frameCountModeLine = {reader.lineNumber(), std::string(line)};
+    m_dropFrameState = state;
 }
 
 /// False for a line that makes no event, because it has too few columns or the timecodes have no provider.

@@ -17,6 +17,8 @@ class EventBase;
 
 namespace cadrel::core::fileio {
 
+class LineReader;
+
 /// Reads CMX EDLs. It skips what it doesn't know, but checks each field: a line that is neither an event nor a comment
 /// is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. Only an event line
 /// with too few columns disappears.
@@ -36,8 +38,13 @@ public:
     util::Result::Type parse(const std::wstring& path, EventList& events, Framerate& framerate,
                              bool acceptAudio) override;
 
-    /// Reads the file for its rate alone: `framerate` becomes what `parse` would give. Returns as `parse`.
-    util::Result::Type detect(const std::wstring& path, Framerate& framerate);
+    util::Result::Type detect(const std::wstring& path, Framerate& framerate) override;
+
+    /// True for everything, since the reader refuses no text.
+    bool recognises(std::string_view beginning) const override;
+
+    /// The "FCM" line that says drop-frame, which stands for a rate of its own.
+    std::optional<SourceLine> rateLine() const override;
 
     /// The rate that the files show. It is drop-frame 30 if the last file says drop-frame. Otherwise it is the lowest
     /// nominal rate for the highest frames field below 60 that this parser has seen, with the drop-frame state of the
@@ -47,11 +54,12 @@ public:
 private:
     template <class EventLineAction, class CommentAction>
     void readLines(const std::wstring& path, EventLineAction onEventLine, CommentAction onComment);
-    void readFrameCountMode(std::string_view line);
+    void readFrameCountMode(const LineReader& reader, std::string_view line);
     bool parseEventLine(std::string_view line, bool acceptAudio, EventBase& event);
     std::optional<Timecode> parseTimecode(std::string_view column);
 
     std::int32_t m_dropFrameState = -1; ///< 0 non-drop, 1 drop-frame
+    SourceLine m_frameCountModeLine;    ///< where `m_dropFrameState` was found
     std::array<std::int32_t, 60> m_frameHistogram{};
 };
 

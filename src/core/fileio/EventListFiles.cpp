@@ -2,8 +2,9 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
-#include "core/fileio/CmxParser.h"
 #include "core/fileio/CmxWriter.h"
+#include "core/fileio/ParserChoice.h"
+#include "core/fileio/ParserInterface.h"
 #include "util/Result.h"
 
 #include <algorithm>
@@ -49,14 +50,19 @@ void EventList::load(const std::wstring& fileName, bool append, Framerate& frame
 {
     if (!append)
         clear();
+    load(fileName, framerate, renameBRolls, acceptAudioChannels, *fileio::parserFor(fileName));
+}
+
+void EventList::load(const std::wstring& fileName, Framerate& framerate, bool renameBRolls, bool acceptAudioChannels,
+                     fileio::ParserInterface& parser)
+{
     EventList loaded;
-    fileio::CmxParser parser;
     const Result::Type result = parser.parse(fileName, loaded, framerate, acceptAudioChannels);
     if (result != Result::Ok)
         throw result;
     if (renameBRolls)
         renameBRollsOf(loaded);
-    this->append(loaded.release());
+    append(loaded.release());
 }
 
 void EventList::load(const std::wstring& fileName, bool append)

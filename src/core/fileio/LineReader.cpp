@@ -38,9 +38,7 @@ std::optional<std::string_view> LineReader::next()
     for (;;) {
         const std::size_t length = unread().find(m_delimiter, searched);
         if (length != std::string_view::npos) {
-            const std::string_view line = unread().substr(0, length);
-            m_begin += length + 1;
-            return StringUtil::trimView(line);
+            return take(length, 1);
         }
         searched = unread().size();
         if (!readMore())
@@ -48,9 +46,34 @@ std::optional<std::string_view> LineReader::next()
     }
     if (unread().empty())
         return std::nullopt;
-    const std::string_view line = unread();
-    m_begin = m_end;
-    return StringUtil::trimView(line);
+    return take(unread().size(), 0);
+}
+
+/// Takes a line off the unread text, counts it and trims it.
+std::string_view LineReader::take(std::size_t length, std::size_t delimiterLength)
+{
+    std::string_view line = unread().substr(0, length);
+    m_begin += length + delimiterLength;
+    // The second byte of a CR LF belongs to the delimiter, on whichever side of it it stands.
+    if (m_delimiter == '\r' && line.starts_with('\n'))
+        line.remove_prefix(1);
+    if (m_delimiter == '\n' && line.ends_with('\r'))
+        line.remove_suffix(1);
+    const std::string_view trimmed = StringUtil::trimView(line);
+    const auto start = static_cast<std::size_t>(trimmed.data() - line.data());
+    m_lineNumber = m_nextLineNumber + innerBreaks(line.substr(0, start));
+    m_nextLineNumber += innerBreaks(line) + 1;
+    return trimmed;
+}
+
+/// The line breaks in a line, which are of the kind that isn't the delimiter.
+std::uint32_t LineReader::innerBreaks(std::string_view text) const
+{
+    const char other = m_delimiter == '\n' ? '\r' : '\n';
+    std::uint32_t count = 0;
+    for (std::size_t place = text.find(other); place != std::string_view::npos; place = text.find(other, place + 1))
+        ++count;
+    return count;
 }
 
 void LineReader::findDelimiter()

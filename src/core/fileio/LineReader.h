@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <filesystem>
 #include <fstream>
 #include <optional>
@@ -23,9 +24,14 @@ public:
     /// file. Throws Result::FileAccessFailed when reading fails.
     std::optional<std::string_view> next();
 
+    /// The number of the line that `next` gave last, as an editor counts: from 1, and each CR, LF or CR LF ends a line.
+    std::uint32_t lineNumber() const { return m_lineNumber; }
+
 private:
     void findDelimiter();
     bool readMore();
+    std::string_view take(std::size_t length, std::size_t delimiterLength);
+    std::uint32_t innerBreaks(std::string_view text) const;
     std::string_view unread() const { return std::string_view(m_buffer).substr(m_begin, m_end - m_begin); }
 
     std::ifstream m_stream;
@@ -33,6 +39,8 @@ private:
     std::size_t m_begin = 0; ///< what has been read and not yet returned starts here
     std::size_t m_end = 0;   ///< and ends here
     char m_delimiter = '\n';
+    std::uint32_t m_lineNumber = 0;     ///< of the line given last
+    std::uint32_t m_nextLineNumber = 1; ///< of the first byte at `m_begin`
 };
 
 } // namespace cadrel::core::fileio

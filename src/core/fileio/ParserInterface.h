@@ -2,10 +2,13 @@
 
 #pragma once
 
+#include "core/fileio/SourceLine.h"
 #include "core/time/Framerate.h"
 #include "util/Result.h"
 
+#include <optional>
 #include <string>
+#include <string_view>
 
 namespace cadrel::core {
 class EventList;
@@ -13,7 +16,7 @@ class EventList;
 
 namespace cadrel::core::fileio {
 
-/// Reads an event list from a file.
+/// Reads event lists of one file format. A new format is a class of this kind, and a line in ParserChoice.cpp.
 class ParserInterface {
 public:
     virtual ~ParserInterface() = default;
@@ -23,6 +26,16 @@ public:
     /// can't be read to its end, with `events` and `framerate` unchanged, or what the conversion of the path throws.
     virtual util::Result::Type parse(const std::wstring& path, EventList& events, Framerate& framerate,
                                      bool acceptAudio) = 0;
+
+    /// Reads the file for its rate alone: `framerate` becomes what `parse` would give. Returns as `parse`.
+    virtual util::Result::Type detect(const std::wstring& path, Framerate& framerate) = 0;
+
+    /// Whether a file that begins so is of this format. `beginning` is all of a short file, and empty for a file that
+    /// can't be read.
+    virtual bool recognises(std::string_view beginning) const = 0;
+
+    /// The line that says which rate the file has that was read last; nothing where its timecodes alone show it.
+    virtual std::optional<SourceLine> rateLine() const = 0;
 
     /// Without audio, and without returning the rate.
     util::Result::Type parse(const std::wstring& path, EventList& events)

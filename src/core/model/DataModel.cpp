@@ -108,8 +108,13 @@ void DataModel::notifyPreviewState()
 
 Result::Type DataModel::generateChangeEdl()
 {
+    return generateChangeEdl([](const GenerationFailure&) {});
+}
+
+Result::Type DataModel::generateChangeEdl(const GenerationFailureListener& onFailure)
+{
     stopListening();
-    const Result::Type result = generateAndHeal();
+    const Result::Type result = generateAndHeal(onFailure);
     if (result != Result::Ok)
         m_changeEdl.clear();
     startListening();
@@ -117,11 +122,11 @@ Result::Type DataModel::generateChangeEdl()
     return result;
 }
 
-Result::Type DataModel::generateAndHeal()
+Result::Type DataModel::generateAndHeal(const GenerationFailureListener& onFailure)
 {
     try {
         m_generator.configure(m_settings.matchBy(), m_settings.vfxPatterns());
-        const Result::Type result = m_generator.generate(m_oldEdl, m_newEdl, m_changeEdl);
+        const Result::Type result = m_generator.generate(m_oldEdl, m_newEdl, m_changeEdl, onFailure);
         if (result == Result::Ok)
             HealProcessing().process(m_changeEdl, {&m_newEdl, &m_settings, Timecode::framerate()});
         return result;

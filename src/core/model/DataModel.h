@@ -82,6 +82,9 @@ public:
     /// Generates the change EDL from the old and the new one by the settings and heals it. A failure is returned, not
     /// thrown, and leaves the change EDL empty. Sends one list change in any case.
     util::Result::Type generateChangeEdl();
+    /// Likewise, and tells `onFailure` first which events of the old and the new EDL the failure is due to. It isn't
+    /// told of a failure that is due to none, such as a VFX row that doesn't compile.
+    util::Result::Type generateChangeEdl(const GenerationFailureListener& onFailure);
     /// Marks the VFX shots of the old and the new EDL by the settings. Throws Result::InvalidArgument for an enabled
     /// row that doesn't compile, with no event touched.
     void applyVfxHandling();
@@ -112,7 +115,7 @@ public:
 
 private:
     void send(const ChangeContext& context);
-    util::Result::Type generateAndHeal();
+    util::Result::Type generateAndHeal(const GenerationFailureListener& onFailure);
     std::array<ChangeContextNotificationBase*, 5> sources();
     bool isPlacedChange(const std::shared_ptr<EventBase>& event) const;
     /// The events of an EDL that play from `in` to `out`.

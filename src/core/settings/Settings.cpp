@@ -15,252 +15,176 @@ namespace {
 
 constexpr std::uint32_t PersistenceVersion = 4;
 
-std::int32_t readMatchBy(ByteArchive& archive)
+// What a number of a stream counts as.
+
+std::int32_t knownMatchBy(std::int32_t value)
 {
-    std::int32_t value = 0;
-    archive >> value;
     return value == 0 ? MatchBy::RollName : MatchBy::ClipName;
 }
 
-std::int32_t readHealMode(ByteArchive& archive)
+std::int32_t knownHealMode(std::int32_t value)
 {
     // A mode after the last one that is offered now is accepted too.
     constexpr std::int32_t LastAccepted = 4;
-    std::int32_t value = 0;
-    archive >> value;
     return value < HealMode::None || value > LastAccepted ? HealMode::None : value;
 }
 
-std::int32_t readApplyTo(ByteArchive& archive)
+std::int32_t knownApplyTo(std::int32_t value)
 {
-    std::int32_t value = 0;
-    archive >> value;
     return value == ApplyTo::SelectedTracks ? ApplyTo::SelectedTracks : ApplyTo::AllTracks;
 }
 
 } // namespace
 
+/// Visits every option in the order of the stream, with the version of the stream that brought it.
+template <typename Self, typename Visitor>
+void Settings::forEachStored(Self& settings, Visitor visit)
+{
+    visit(settings.matchBy, 0, knownMatchBy);
+    visit(settings.healMode, 0, knownHealMode);
+    visit(settings.applyTo, 1, knownApplyTo);
+    visit(settings.createDestinationMarkers, 0);
+    visit(settings.createDissolveWipeMarkers, 0);
+    visit(settings.createInsertMarkers, 0);
+    visit(settings.createAudioSnippetMarkers, 1);
+    visit(settings.createAutomationWarningMarkers, 1);
+    visit(settings.createOverlapMarkers, 1);
+    visit(settings.vfxPatterns, 0);
+    visit(settings.snippetUsesPercentage, 0);
+    visit(settings.snippetMaxPercentage, 0);
+    visit(settings.includeOverhangingAudioEvents, 0);
+    visit(settings.snippetThreshold, 0);
+    visit(settings.bRollRenaming, 2);
+    visit(settings.remainsThreshold, 2);
+    visit(settings.createVirginTerritories, 3);
+    visit(settings.restrictRange, 4);
+    visit(settings.preserveMaterialBefore, 4);
+    visit(settings.preserveMaterialAfter, 4);
+}
+
+/// Reads the options that a version has from a stream of it. The others get their usual values, except that reading
+/// version 0 leaves them alone.
+class Settings::Reader {
+public:
+    Reader(ByteArchive& archive, std::uint32_t version) : m_archive(archive), m_version(version) {}
+
+    template <typename T>
+    void operator()(Option<T>& option, std::uint32_t sinceVersion) const
+    {
+        if (m_version >= sinceVersion)
+            m_archive >> option.m_value;
+        else if (m_version > 0)
+            option.m_value = option.m_usual;
+    }
+
+    void operator()(Option<std::int32_t>& option, std::uint32_t sinceVersion, std::int32_t (*known)(std::int32_t)) const
+    {
+        (*this)(option, sinceVersion);
+        if (m_version >= sinceVersion)
+            option.m_value = known(option.m_value);
+    }
+
+    void operator()(Option<std::vector<VfxPatternEntry>>& option, std::uint32_t) const
+    {
+        std::vector<VfxPatternEntry>& rows = option.m_value;
+        if (m_version == 0) {
+            // Neither a count nor frames: the stream has as many rows as the object.
+            for (VfxPatternEntry& row : rows)
+                row.readCurrent(m_archive);
+            return;
+        }
+        rows.clear();
+        for (std::size_t left = m_archive.readCount(); left > 0; --left)
+            m_archive >> rows.emplace_back();
+    }
+
+private:
+    ByteArchive& m_archive;
+    std::uint32_t m_version;
+};
+
+/// Writes the options as the present version has them.
+class Settings::Writer {
+public:
+    explicit Writer(ByteArchive& archive) : m_archive(archive) {}
+
+    template <typename T, typename... Known>
+    void operator()(const Option<T>& option, std::uint32_t, Known...) const
+    {
+        m_archive << option();
+    }
+
+    void operator()(const Option<std::vector<VfxPatternEntry>>& option, std::uint32_t) const
+    {
+        m_archive.writeCount(option().size());
+        for (const VfxPatternEntry& row : option())
+            m_archive << row;
+    }
+
+private:
+    ByteArchive& m_archive;
+};
+
 Settings::Settings() : Serializable(PersistenceVersion) {}
 
 const VfxPatternEntry& Settings::vfxPattern(std::size_t index) const
 {
-    if (index >= m_vfxPatterns.size())
+    if (index >= vfxPatterns().size())
         throw Result::InvalidArgument;
-    return m_vfxPatterns[index];
+    return vfxPatterns()[index];
 }
 
-void Settings::setMatchBy(std::int32_t value)
+void Settings::setVfxPattern(const VfxPatternEntry& entry, std::size_t index)
 {
-    m_matchBy = value;
-    notifyListeners();
-}
-
-void Settings::setHealMode(std::int32_t value)
-{
-    m_healMode = value;
-    notifyListeners();
-}
-
-void Settings::setApplyTo(std::int32_t value)
-{
-    m_applyTo = value;
-    notifyListeners();
-}
-
-void Settings::setCreateDestinationMarkers(bool flag)
-{
-    m_createDestinationMarkers = flag;
-    notifyListeners();
-}
-
-void Settings::setCreateDissolveWipeMarkers(bool flag)
-{
-    m_createDissolveWipeMarkers = flag;
-    notifyListeners();
-}
-
-void Settings::setCreateInsertMarkers(bool flag)
-{
-    m_createInsertMarkers = flag;
-    notifyListeners();
-}
-
-void Settings::setCreateAudioSnippetMarkers(bool flag)
-{
-    m_createAudioSnippetMarkers = flag;
-    notifyListeners();
-}
-
-void Settings::setRemainsThreshold(std::int32_t frames)
-{
-    m_remainsThreshold = frames;
-    notifyListeners();
-}
-
-void Settings::setCreateAutomationWarningMarkers(bool flag)
-{
-    m_createAutomationWarningMarkers = flag;
-    notifyListeners();
-}
-
-void Settings::setCreateOverlapMarkers(bool flag)
-{
-    m_createOverlapMarkers = flag;
-    notifyListeners();
-}
-
-void Settings::setBRollRenaming(bool flag)
-{
-    m_bRollRenaming = flag;
-    notifyListeners();
-}
-
-void Settings::setRestrictRange(bool flag)
-{
-    if (flag == m_restrictRange)
-        return;
-    m_restrictRange = flag;
-    notifyListeners();
+    if (index >= vfxPatterns().size())
+        throw Result::InvalidArgument;
+    vfxPatterns.m_value[index] = entry;
 }
 
 void Settings::setPreserveMaterial(double before, double after)
 {
     if (after >= before) {
-        m_preserveMaterialBefore = before;
-        m_preserveMaterialAfter = after;
+        preserveMaterialBefore.store(before);
+        preserveMaterialAfter.store(after);
     }
     // Notifies also for refused values, so that a dialog that shows them goes back to the stored ones.
     notifyListeners();
 }
 
-void Settings::setVfxPattern(const VfxPatternEntry& entry, std::size_t index)
-{
-    if (index >= m_vfxPatterns.size())
-        throw Result::InvalidArgument;
-    m_vfxPatterns[index] = entry;
-}
-
-void Settings::setSnippetUsesPercentage(bool flag)
-{
-    m_snippetUsesPercentage = flag;
-}
-
-void Settings::setSnippetMaxPercentage(double percent)
-{
-    m_snippetMaxPercentage = percent;
-}
-
-void Settings::setIncludeOverhangingAudioEvents(bool flag)
-{
-    m_includeOverhangingAudioEvents = flag;
-}
-
-void Settings::setSnippetThreshold(std::int32_t frames)
-{
-    m_snippetThreshold = frames;
-}
-
-void Settings::setCreateVirginTerritories(bool flag)
-{
-    m_createVirginTerritories = flag;
-}
-
 void Settings::reset()
 {
-    Settings defaults;
-    defaults.m_vfxPatterns = m_vfxPatterns;
-    defaults.m_vfxPatterns.resize(VfxRowCount);
-    *this = defaults;
+    Settings usual;
+    usual.vfxPatterns.m_value = vfxPatterns();
+    usual.vfxPatterns.m_value.resize(VfxRowCount);
+    *this = usual;
 }
 
 void Settings::readCurrent(ByteArchive& archive)
 {
-    readOptions(archive, PersistenceVersion);
+    forEachStored(*this, Reader(archive, PersistenceVersion));
     notifyListeners();
 }
 
 void Settings::write(ByteArchive& archive) const
 {
-    archive << m_matchBy << m_healMode << m_applyTo;
-    archive << m_createDestinationMarkers << m_createDissolveWipeMarkers << m_createInsertMarkers
-            << m_createAudioSnippetMarkers;
-    archive << m_createAutomationWarningMarkers << m_createOverlapMarkers;
-    archive.writeCount(m_vfxPatterns.size());
-    for (const VfxPatternEntry& row : m_vfxPatterns)
-        archive << row;
-    archive << m_snippetUsesPercentage << m_snippetMaxPercentage << m_includeOverhangingAudioEvents
-            << m_snippetThreshold;
-    archive << m_bRollRenaming << m_remainsThreshold;
-    archive << m_createVirginTerritories;
-    archive << m_restrictRange << m_preserveMaterialBefore << m_preserveMaterialAfter;
+    forEachStored(*this, Writer(archive));
 }
 
 void Settings::readOlder(ByteArchive& archive, std::uint32_t version)
 {
     if (version >= PersistenceVersion)
         throw Result::UnknownVersion;
-    if (version == 0)
-        readFirstVersion(archive);
-    else
-        readOptions(archive, version);
-    m_vfxPatterns.resize(VfxRowCount);
+    forEachStored(*this, Reader(archive, version));
+    // Projects of these versions were processed with virgin territories.
+    if (version == 1 || version == 2)
+        createVirginTerritories.m_value = true;
+    vfxPatterns.m_value.resize(VfxRowCount);
     notifyListeners();
 }
 
 void Settings::notifyListeners()
 {
     notify(ChangeContext(ChangeContext::SettingsChanged));
-}
-
-void Settings::readOptions(ByteArchive& archive, std::uint32_t version)
-{
-    m_matchBy = readMatchBy(archive);
-    m_healMode = readHealMode(archive);
-    m_applyTo = readApplyTo(archive);
-    archive >> m_createDestinationMarkers >> m_createDissolveWipeMarkers >> m_createInsertMarkers >>
-        m_createAudioSnippetMarkers;
-    archive >> m_createAutomationWarningMarkers >> m_createOverlapMarkers;
-    readVfxPatterns(archive);
-    readSnippetOptions(archive);
-
-    // An option that an older version doesn't have gets the value with which its projects were processed: virgin
-    // territories were always created then.
-    m_bRollRenaming = true;
-    m_remainsThreshold = 5;
-    m_createVirginTerritories = true;
-    m_restrictRange = false;
-    m_preserveMaterialBefore = 0.0;
-    m_preserveMaterialAfter = 0.0;
-    if (version >= 2)
-        archive >> m_bRollRenaming >> m_remainsThreshold;
-    if (version >= 3)
-        archive >> m_createVirginTerritories;
-    if (version >= 4)
-        archive >> m_restrictRange >> m_preserveMaterialBefore >> m_preserveMaterialAfter;
-}
-
-void Settings::readFirstVersion(ByteArchive& archive)
-{
-    m_matchBy = readMatchBy(archive);
-    m_healMode = readHealMode(archive);
-    archive >> m_createDestinationMarkers >> m_createDissolveWipeMarkers >> m_createInsertMarkers;
-    // The stream has neither a count nor frames: it has as many rows as the object.
-    for (VfxPatternEntry& row : m_vfxPatterns)
-        row.readCurrent(archive);
-    readSnippetOptions(archive);
-}
-
-void Settings::readVfxPatterns(ByteArchive& archive)
-{
-    m_vfxPatterns.clear();
-    for (std::size_t left = archive.readCount(); left > 0; --left)
-        archive >> m_vfxPatterns.emplace_back();
-}
-
-void Settings::readSnippetOptions(ByteArchive& archive)
-{
-    archive >> m_snippetUsesPercentage >> m_snippetMaxPercentage >> m_includeOverhangingAudioEvents >>
-        m_snippetThreshold;
 }
 
 } // namespace cadrel::core

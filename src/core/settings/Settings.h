@@ -5,6 +5,7 @@
 #include "core/notify/ChangeContextNotificationBase.h"
 #include "core/serialize/Serializable.h"
 #include "core/settings/MatchBy.h"
+#include "core/settings/Option.h"
 #include "core/settings/VfxPatternEntry.h"
 
 #include <cstddef>
@@ -21,8 +22,11 @@ struct ApplyTo {
     enum Type : std::int32_t { AllTracks = 0, SelectedTracks = 1 };
 };
 
-/// Every option of the system. A setter stores and then sends a plain ChangeContext of type SettingsChanged; setters
-/// for which this doesn't hold say so.
+/// Every option of the system. A new one is a line in the table of options, a setter, and a line in
+/// Settings::forEachStored, which gives its place in the stream.
+///
+/// A setter stores and then sends a plain ChangeContext of type SettingsChanged, as the table says: always, only when
+/// the value changes, or never.
 class Settings : public serialize::Serializable, public ChangeContextNotificationBase {
 public:
     static constexpr std::size_t VfxRowCount = 3;
@@ -34,58 +38,59 @@ public:
     Settings& operator=(const Settings&) = default;
     ~Settings() override = default;
 
-    std::int32_t matchBy() const { return m_matchBy; }
-    std::int32_t healMode() const { return m_healMode; }
-    std::int32_t applyTo() const { return m_applyTo; }
-    bool createDestinationMarkers() const { return m_createDestinationMarkers; }
-    bool createDissolveWipeMarkers() const { return m_createDissolveWipeMarkers; }
-    bool createInsertMarkers() const { return m_createInsertMarkers; }
-    bool createAudioSnippetMarkers() const { return m_createAudioSnippetMarkers; }
-    /// In frames.
-    std::int32_t remainsThreshold() const { return m_remainsThreshold; }
-    bool createAutomationWarningMarkers() const { return m_createAutomationWarningMarkers; }
-    bool createOverlapMarkers() const { return m_createOverlapMarkers; }
-    const std::vector<VfxPatternEntry>& vfxPatterns() const { return m_vfxPatterns; }
-    /// Throws Result::InvalidArgument for an index at or beyond the number of rows.
-    const VfxPatternEntry& vfxPattern(std::size_t index) const;
-    bool snippetUsesPercentage() const { return m_snippetUsesPercentage; }
-    /// Percent of a clip.
-    double snippetMaxPercentage() const { return m_snippetMaxPercentage; }
-    bool includeOverhangingAudioEvents() const { return m_includeOverhangingAudioEvents; }
-    /// In frames.
-    std::int32_t snippetThreshold() const { return m_snippetThreshold; }
-    bool bRollRenaming() const { return m_bRollRenaming; }
-    bool createVirginTerritories() const { return m_createVirginTerritories; }
-    bool restrictRange() const { return m_restrictRange; }
-    /// In seconds, signed.
-    double preserveMaterialBefore() const { return m_preserveMaterialBefore; }
-    double preserveMaterialAfter() const { return m_preserveMaterialAfter; }
+    // The options, each with its value in new settings.
+    Option<std::int32_t> matchBy{MatchBy::RollName};
+    Option<std::int32_t> healMode{HealMode::Normal};
+    Option<std::int32_t> applyTo{ApplyTo::AllTracks};
+    Option<bool> createDestinationMarkers{true};
+    Option<bool> createDissolveWipeMarkers{true};
+    Option<bool> createInsertMarkers{true};
+    Option<bool> createAudioSnippetMarkers{true};
+    Option<std::int32_t> remainsThreshold{5}; ///< frames
+    Option<bool> createAutomationWarningMarkers{true};
+    Option<bool> createOverlapMarkers{true};
+    Option<std::vector<VfxPatternEntry>> vfxPatterns{std::vector<VfxPatternEntry>(VfxRowCount), Notifies::Never};
+    Option<bool> snippetUsesPercentage{true, Notifies::Never};
+    Option<double> snippetMaxPercentage{50.0, Notifies::Never}; ///< percent of a clip
+    Option<bool> includeOverhangingAudioEvents{false, Notifies::Never};
+    Option<std::int32_t> snippetThreshold{5, Notifies::Never}; ///< frames
+    Option<bool> bRollRenaming{true};
+    Option<bool> createVirginTerritories{false, Notifies::Never};
+    Option<bool> restrictRange{false, Notifies::OnChange};
+    Option<double> preserveMaterialBefore{0.0}; ///< seconds, signed
+    Option<double> preserveMaterialAfter{0.0};  ///< seconds, signed
 
-    void setMatchBy(std::int32_t value);
-    void setHealMode(std::int32_t value);
-    void setApplyTo(std::int32_t value);
-    void setCreateDestinationMarkers(bool flag);
-    void setCreateDissolveWipeMarkers(bool flag);
-    void setCreateInsertMarkers(bool flag);
-    void setCreateAudioSnippetMarkers(bool flag);
-    void setRemainsThreshold(std::int32_t frames);
-    void setCreateAutomationWarningMarkers(bool flag);
-    void setCreateOverlapMarkers(bool flag);
-    void setBRollRenaming(bool flag);
-    /// Notifies only when the value changes.
-    void setRestrictRange(bool flag);
+    void setMatchBy(std::int32_t value) { set(matchBy, value); }
+    void setHealMode(std::int32_t value) { set(healMode, value); }
+    void setApplyTo(std::int32_t value) { set(applyTo, value); }
+    void setCreateDestinationMarkers(bool flag) { set(createDestinationMarkers, flag); }
+    void setCreateDissolveWipeMarkers(bool flag) { set(createDissolveWipeMarkers, flag); }
+    void setCreateInsertMarkers(bool flag) { set(createInsertMarkers, flag); }
+    void setCreateAudioSnippetMarkers(bool flag) { set(createAudioSnippetMarkers, flag); }
+    void setRemainsThreshold(std::int32_t frames) { set(remainsThreshold, frames); }
+    void setCreateAutomationWarningMarkers(bool flag) { set(createAutomationWarningMarkers, flag); }
+    void setCreateOverlapMarkers(bool flag) { set(createOverlapMarkers, flag); }
+    void setSnippetUsesPercentage(bool flag) { set(snippetUsesPercentage, flag); }
+    void setSnippetMaxPercentage(double percent) { set(snippetMaxPercentage, percent); }
+    void setIncludeOverhangingAudioEvents(bool flag) { set(includeOverhangingAudioEvents, flag); }
+    void setSnippetThreshold(std::int32_t frames) { set(snippetThreshold, frames); }
+    void setBRollRenaming(bool flag) { set(bRollRenaming, flag); }
+    void setCreateVirginTerritories(bool flag) { set(createVirginTerritories, flag); }
+    void setRestrictRange(bool flag) { set(restrictRange, flag); }
+    /// Sets one of the options that have no rule of their own, as its setter does.
+    template <typename T>
+    void set(Option<T> Settings::*option, const T& value)
+    {
+        set(this->*option, value);
+    }
     /// Stores both only when `after` >= `before`; notifies in any case.
     void setPreserveMaterial(double before, double after);
 
-    /// These send nothing. setVfxPattern throws Result::InvalidArgument as vfxPattern does.
+    /// Throw Result::InvalidArgument for an index at or beyond the number of rows. Setting a row sends nothing.
+    const VfxPatternEntry& vfxPattern(std::size_t index) const;
     void setVfxPattern(const VfxPatternEntry& entry, std::size_t index);
-    void setSnippetUsesPercentage(bool flag);
-    void setSnippetMaxPercentage(double percent);
-    void setIncludeOverhangingAudioEvents(bool flag);
-    void setSnippetThreshold(std::int32_t frames);
-    void setCreateVirginTerritories(bool flag);
 
-    /// Back to the defaults, except that the pattern rows keep their content and are only brought to three. Sends
+    /// Back to the usual values, except that the pattern rows keep their content and are only brought to three. Sends
     /// nothing.
     void reset();
 
@@ -94,34 +99,18 @@ public:
     void readOlder(serialize::ByteArchive& archive, std::uint32_t version) override;
 
 private:
-    void notifyListeners();
-    /// The body of version 1 or later.
-    void readOptions(serialize::ByteArchive& archive, std::uint32_t version);
-    /// The body of version 0.
-    void readFirstVersion(serialize::ByteArchive& archive);
-    void readVfxPatterns(serialize::ByteArchive& archive);
-    void readSnippetOptions(serialize::ByteArchive& archive);
+    class Reader;
+    class Writer;
 
-    std::int32_t m_matchBy = MatchBy::RollName;
-    std::int32_t m_healMode = HealMode::Normal;
-    std::int32_t m_applyTo = ApplyTo::AllTracks;
-    bool m_createDestinationMarkers = true;
-    bool m_createDissolveWipeMarkers = true;
-    bool m_createInsertMarkers = true;
-    bool m_createAudioSnippetMarkers = true;
-    std::int32_t m_remainsThreshold = 5;
-    bool m_createAutomationWarningMarkers = true;
-    bool m_createOverlapMarkers = true;
-    std::vector<VfxPatternEntry> m_vfxPatterns = std::vector<VfxPatternEntry>(VfxRowCount);
-    bool m_snippetUsesPercentage = true;
-    double m_snippetMaxPercentage = 50.0;
-    bool m_includeOverhangingAudioEvents = false;
-    std::int32_t m_snippetThreshold = 5;
-    bool m_bRollRenaming = true;
-    bool m_createVirginTerritories = false;
-    bool m_restrictRange = false;
-    double m_preserveMaterialBefore = 0.0;
-    double m_preserveMaterialAfter = 0.0;
+    template <typename T>
+    void set(Option<T>& option, const T& value)
+    {
+        if (option.store(value))
+            notifyListeners();
+    }
+    template <typename Self, typename Visitor>
+    static void forEachStored(Self& settings, Visitor visit);
+    void notifyListeners();
 };
 
 } // namespace cadrel::core

@@ -35,7 +35,8 @@ public:
 
     /// An exact copy, `isInitialized` included.
     Timecode(const Timecode& other) = default;
-    /// Copies the fields; the target counts as initialized whatever the source is.
+    /// Copies the fields; the target counts as initialized whatever the source is. That is deliberate: a value is only
+    /// uninitialized as long as nobody has given it one.
     Timecode& operator=(const Timecode& other);
     ~Timecode() override = default;
 

@@ -635,6 +635,54 @@ TEST(ChangeEdlGenerator, ATransitionThatLeavesTheDayFailsForAValidEvent)
     EXPECT_EQ(thrownBy([&] { ChangeEdlGenerator().generate(plain, listOf({atTheEnd}), changes); }), Result::OutOfRange);
 }
 
+/// The events that a generation says it failed on, which it says once.
+core::GenerationFailure failureOf(const EventList& oldEvents, const EventList& newEvents)
+{
+    std::vector<core::GenerationFailure> failures;
+    EventList changes;
+    const auto listener = [&](const core::GenerationFailure& failure) { failures.push_back(failure); };
+    EXPECT_EQ(thrownBy([&] { ChangeEdlGenerator().generate(oldEvents, newEvents, changes, listener); }),
+              Result::OutOfRange);
+    EXPECT_EQ(failures.size(), 1U);
+    return failures.empty() ? core::GenerationFailure() : failures.front();
+}
+
+TEST(ChangeEdlGenerator, AFailureTellsTheOneEventWhoseTransitionCantBeCutOut)
+{
+    const TestProject project;
+    const Event endless = makeTransition(TransitionType::Wipe, 9999999,
+                                         makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"));
+    const Event dissolve = makeTransition(TransitionType::Dissolve, 25,
+                                          makeEvent("C", "00:01:00:00", "00:01:10:00", "01:00:20:00", "01:00:30:00"));
+    const EventList plain = listOf({makeEvent("B", "00:01:00:00", "00:01:10:00", "01:00:10:00", "01:00:20:00")});
+
+    const core::GenerationFailure inOld = failureOf(listOf({dissolve, endless}), plain);
+    EXPECT_EQ(inOld.oldEvent, endless);
+    EXPECT_EQ(inOld.newEvent, nullptr);
+
+    const core::GenerationFailure inNew = failureOf(plain, listOf({endless, dissolve}));
+    EXPECT_EQ(inNew.oldEvent, nullptr);
+    EXPECT_EQ(inNew.newEvent, endless);
+}
+
+TEST(ChangeEdlGenerator, AFailureTellsTheTwoEventsThatCantBeBroughtTogether)
+{
+    const TestProject project;
+    const Event fine = makeEvent("B", "00:01:00:00", "00:01:10:00", "00:59:00:00", "00:59:10:00");
+    const Event early = makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00");
+    const Event late = makeEvent("A", "00:01:00:00", "00:01:08:01", "23:59:51:24", "23:59:59:24");
+    const Event invalid = makeEvent("A", "00:02:00:00", "00:01:00:00", "01:00:00:00", "01:00:08:00");
+
+    // The invalid event takes no part, and still counts where the old event is found.
+    const core::GenerationFailure lateInNew = failureOf(listOf({fine, invalid, early}), listOf({fine, late}));
+    EXPECT_EQ(lateInNew.oldEvent, early);
+    EXPECT_EQ(lateInNew.newEvent, late);
+
+    const core::GenerationFailure lateInOld = failureOf(listOf({early, late, fine}), listOf({early}));
+    EXPECT_EQ(lateInOld.oldEvent, late) << "of twins, the one that leaves the day";
+    EXPECT_EQ(lateInOld.newEvent, early);
+}
+
 TEST(ChangeEdlGenerator, AnInvalidEventWhoseTransitionCannotBeCutOutTakesNoPart)
 {
     const Event atTheEnd = makeTransition(TransitionType::Dissolve, 250,

@@ -146,6 +146,37 @@ TEST(EventBase, ACopyHasTheSameFieldsWithoutTheTextOfFlawOne)
     EXPECT_EQ(copy.flawText(), "");
 }
 
+TEST(EventBase, ComesFromNoLineUntilAReaderSaysSoAndItsCopiesComeFromTheSame)
+{
+    EventBase source;
+    EXPECT_EQ(source.sourceLine(), 0U);
+
+    source.setSourceLine(12);
+    const EventBase copy(source);
+    EventBase assigned;
+    assigned = source;
+
+    EXPECT_EQ(copy.sourceLine(), 12U);
+    EXPECT_EQ(assigned.sourceLine(), 12U);
+}
+
+TEST(EventBase, TheLineThatItComesFromIsNotStored)
+{
+    const TestProject project;
+    const auto event = doubleSpeedEvent();
+    core::serialize::ByteArchive without;
+    without << *event;
+
+    event->setSourceLine(12);
+    core::serialize::ByteArchive with;
+    with << *event;
+
+    EXPECT_EQ(bytesOf(with), bytesOf(without));
+    with.rewind();
+    with >> *event;
+    EXPECT_EQ(event->sourceLine(), 0U);
+}
+
 TEST(EventBase, AssignmentKeepsTheTargetsOwnTextOfFlawOne)
 {
     const auto target = fullEvent();

@@ -835,5 +835,97 @@ RC_GTEST_PROP(CmxParserLaw, EveryEventKeepsItsLineAsTheFirstOfItsComment, ())
     }
 }
 
+/// The numbers of the lines that the events of a text come from.
+std::vector<std::uint32_t> linesOf(const std::string& text)
+{
+    const EdlReading reading(text);
+    std::vector<std::uint32_t> lines;
+    for (const auto& event : reading.events.events())
+        lines.push_back(event->sourceLine());
+    return lines;
+}
+
+TEST(CmxParser, TellsTheLineOfEachEventWhateverEndsTheLines)
+{
+    const TestProject project;
+    using Lines = std::vector<std::uint32_t>;
+    // The comment is line 4, and line 5 is empty.
+    for (const std::string end : {"\n", "\r", "\r\n"}) {
+        EXPECT_EQ(linesOf("TITLE: X" + end + Cut + end + Cut + end + "* A" + end + end + Cut), (Lines{2, 3, 6}));
+        EXPECT_EQ(linesOf(Cut + end), (Lines{1}));
+        EXPECT_EQ(linesOf(end + end + Cut), (Lines{3}));
+        EXPECT_EQ(linesOf("001 AX V C" + end + Cut), (Lines{2})) << "a dropped line counts";
+    }
+}
+
+TEST(CmxParser, CountsLinesAsAnEditorDoesWhereTheEndsOfLinesAreMixed)
+{
+    const TestProject project;
+    using Lines = std::vector<std::uint32_t>;
+
+    EXPECT_EQ(linesOf("TITLE: X\n" + Cut + "\r\n" + Cut + "\n" + Cut), (Lines{2, 3, 4}));
+    EXPECT_EQ(linesOf("TITLE: X\n" + Cut + "\r\r" + Cut + "\n" + Cut), (Lines{2, 5}));
+    EXPECT_EQ(linesOf("TITLE: X\r\nFCM: NON-DROP FRAME\n\n* A\r\n" + Cut), (Lines{5}));
+    EXPECT_EQ(linesOf("TITLE: X\n \r\r" + Cut), (Lines{4}));
+}
+
+TEST(CmxParser, TellsTheLineThatSaysDropFrame)
+{
+    const TestProject project;
+    const TempFolder folder;
+    const auto lineOf = [&](const std::string& text) {
+        CmxParser parser;
+        core::EventList events;
+        const std::wstring path = widePath(folder.write("reel.edl", text));
+        EXPECT_EQ(parser.parse(path, events), Result::Ok);
+        const auto parsed = parser.rateLine();
+        Framerate framerate;
+        EXPECT_EQ(parser.detect(path, framerate), Result::Ok);
+        EXPECT_EQ(parser.rateLine(), parsed);
+        return parsed;
+    };
+    using core::fileio::SourceLine;
+
+    EXPECT_EQ(lineOf("TITLE: X\n  FCM: DROP FRAME \n" + Cut), (SourceLine{2, "FCM: DROP FRAME"}));
+    EXPECT_EQ(lineOf("FCM: DROP FRAME\n" + Cut + "\nFCM: DROP FRAME, STILL"), (SourceLine{1, "FCM: DROP FRAME"}));
+    EXPECT_EQ(lineOf("FCM: DROP FRAME\nFCM: NON-DROP FRAME\nFCM: DROP FRAME\n"), (SourceLine{3, "FCM: DROP FRAME"}));
+    EXPECT_EQ(lineOf("FCM: DROP FRAME\nFCM: NON-DROP FRAME\n"), std::nullopt);
+    EXPECT_EQ(lineOf("FCM: SOMETHING\n" + cutWithFrames("29")), std::nullopt);
+}
+
+/// The lines of a text as an editor counts them.
+std::vector<std::string> editorLines(const std::string& text)
+{
+    std::vector<std::string> lines(1);
+    for (std::size_t place = 0; place < text.size(); ++place) {
+        if (text[place] == '\n' || (text[place] == '\r' && text.substr(place + 1, 1) != "\n"))
+            lines.emplace_back();
+        else if (text[place] != '\r')
+            lines.back() += text[place];
+    }
+    return lines;
+}
+
+RC_GTEST_PROP(CmxParserLaw, EveryEventBeginsInTheLineThatItTells, ())
+{
+    const TestProject project;
+    std::string text = anyEdlText();
+    for (char& character : text) {
+        if (character == '\n' && *rc::gen::inRange(0, 4) == 0)
+            character = '\r';
+    }
+
+    const EdlReading reading(text);
+
+    const std::vector<std::string> lines = editorLines(text);
+    for (const auto& event : reading.events.events()) {
+        RC_ASSERT(event->sourceLine() >= 1U);
+        RC_ASSERT(event->sourceLine() <= lines.size());
+        const std::string line = util::StringUtil::trim(lines[event->sourceLine() - 1]);
+        RC_ASSERT(!line.empty());
+        RC_ASSERT(event->comment().starts_with(line));
+    }
+}
+
 } // namespace
 } // namespace cadrel::tests

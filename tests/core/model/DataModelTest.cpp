@@ -33,8 +33,10 @@ using core::DataModel;
 using core::EventBase;
 using core::EventList;
 using core::Framerate;
+using core::GenerationFailure;
 using core::PropertyKey;
 using core::Timecode;
+using core::TransitionType;
 using core::Variant;
 using core::VfxPatternEntry;
 using core::VideoList;
@@ -372,6 +374,31 @@ TEST_F(Model, ARowThatDoesNotCompileEmptiesTheChangeListAndIsTheResult)
     EXPECT_EQ(heard().types, Types{ChangeContext::EventListChanged});
     EXPECT_EQ(heard().listKinds, Types{2});
     EXPECT_TRUE(isListening());
+}
+
+TEST_F(Model, AFailureThatIsDueToAnEventTellsWhichOneItIs)
+{
+    fill();
+    const auto endless = makeEvent("A", "00:10:00:00", "00:10:10:00", "01:10:00:00", "01:10:10:00");
+    endless->setTransitionType(TransitionType::Dissolve);
+    endless->setTransitionDuration(9999999);
+    model.newEdl().add(endless);
+    GenerationFailure failure;
+
+    const Result::Type result = model.generateChangeEdl([&](const GenerationFailure& told) { failure = told; });
+
+    EXPECT_EQ(result, Result::OutOfRange);
+    EXPECT_EQ(failure.newEvent, endless);
+    EXPECT_EQ(failure.oldEvent, nullptr);
+    EXPECT_TRUE(model.changeEdl().isEmpty());
+}
+
+TEST_F(Model, AFailureThatIsDueToNoEventTellsNone)
+{
+    fill();
+    model.settings().setVfxPattern(VfxPatternEntry("A/B", "", true), 1);
+
+    EXPECT_EQ(model.generateChangeEdl([](const GenerationFailure&) { ADD_FAILURE(); }), Result::InvalidArgument);
 }
 
 TEST_F(Model, AFailureOfTheGeneratorEmptiesTheChangeListAndIsTheResult)

@@ -365,6 +365,38 @@ TEST(Settings, BringsTheRowsToThreeInAReset)
                                                                   VfxPatternEntry(), VfxPatternEntry()}));
 }
 
+TEST(Settings, SetsAnOptionByItsPlaceAsItsSetterDoes)
+{
+    Settings settings;
+    RecordingListener listener;
+    settings.addListener(&listener);
+
+    settings.set(&Settings::matchBy, 1);
+    EXPECT_EQ(settings.matchBy(), 1);
+    EXPECT_EQ(listener.types, Types{ChangeContext::SettingsChanged});
+
+    settings.set(&Settings::restrictRange, false);
+    settings.set(&Settings::createVirginTerritories, true);
+    EXPECT_TRUE(settings.createVirginTerritories());
+    EXPECT_EQ(listener.types.size(), 1U);
+
+    settings.set(&Settings::restrictRange, true);
+    EXPECT_EQ(listener.types.size(), 2U);
+}
+
+TEST(Settings, KnowsTheUsualValueOfAnOption)
+{
+    Settings settings;
+    EXPECT_TRUE(settings.snippetThreshold.isUsual());
+
+    settings.setSnippetThreshold(6);
+    EXPECT_FALSE(settings.snippetThreshold.isUsual());
+    EXPECT_EQ(settings.snippetThreshold.usual(), 5);
+
+    settings.setSnippetThreshold(5);
+    EXPECT_TRUE(settings.snippetThreshold.isUsual());
+}
+
 TEST(Settings, CopiesWithoutListeners)
 {
     Settings settings = unusualSettings();
@@ -599,6 +631,16 @@ TEST(Settings, KeepsEveryOptionThatVersion0DoesNotHold)
     EXPECT_EQ(settings.snippetMaxPercentage(), 50.0);
     EXPECT_FALSE(settings.includeOverhangingAudioEvents());
     EXPECT_EQ(settings.snippetThreshold(), 5);
+}
+
+TEST(Settings, KeepsAnOddNumberThatVersion0DoesNotHold)
+{
+    Settings settings;
+    settings.setApplyTo(7);
+
+    read(settings, "00000000 01000000 03000000 00 00 00 " + RowVfx + RowEmpty + RowCg + Snippets);
+
+    EXPECT_EQ(settings.applyTo(), 7);
 }
 
 TEST(Settings, ReadsAsManyRowsOfVersion0AsItHasAndThenHasThree)
