@@ -5,6 +5,7 @@
 
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
+#include "core/model/VideoList.h"
 #include "core/time/SecondsRange.h"
 #include "core/time/Timecode.h"
 #include "host/Host.h"
@@ -141,13 +142,8 @@ public:
     Tracks usersTracks() const
     {
         Tracks tracks = project.allTracks();
-        int videos = 0;
-        std::erase_if(tracks, [&](standin::Track* track) {
-            using Kind = standin::Track::Kind;
-            // The first two carry the old and the new picture.
-            if (track->kind() == Kind::Video)
-                return ++videos <= 2;
-            return track->isFolder() || track->kind() == Kind::Ruler || hasRole(*track);
+        std::erase_if(tracks, [](standin::Track* track) {
+            return track->isFolder() || track->kind() == standin::Track::Kind::Ruler || hasRole(*track);
         });
         return tracks;
     }
@@ -197,6 +193,10 @@ private:
         const auto firstFrame = static_cast<std::int32_t>(std::ceil(origin * rate.rate));
         for (std::uint64_t count = 1 + m_chance.below(8); count > 0; --count)
             carryOver(firstFrame, rate);
+        if (m_chance.oneIn(2)) {
+            model().videoList().add(
+                core::VideoList::Entry("/picture/reel3_v12.mov", Timecode(firstFrame), Timecode(0, 0, 40, 0)), false);
+        }
     }
 
     void carryOver(std::int32_t firstFrame, const core::Framerate& rate)
@@ -217,15 +217,18 @@ private:
         changes.push_back({inHost(source), inHost(destination), inHost(source + length) - inHost(source)});
     }
 
-    /// Whether something in the random attributes makes it one of the system's.
+    /// Whether something in the random attributes makes it one on which the system writes.
     static bool hasRole(standin::Track& track)
     {
+        using Kind = standin::Track::Kind;
+        const bool isVideo = track.kind() == Kind::Video;
         FVariant role;
-        if (track.kind() != standin::Track::Kind::Marker ||
-            track.getAttribute(AttributeKey::MarkerType, role) != ResultOk || !role.isInteger())
+        if ((!isVideo && track.kind() != Kind::Marker) ||
+            track.getAttribute(isVideo ? AttributeKey::VideoType : AttributeKey::MarkerType, role) != ResultOk ||
+            !role.isInteger())
             return false;
         const std::int64_t kind = role.asInteger() & 0xff;
-        return kind >= TrackRole::Destination && kind <= TrackRole::LastMarker;
+        return isVideo ? kind == TrackRole::NewVideo : kind >= TrackRole::Destination && kind <= TrackRole::LastMarker;
     }
 
     Chance& m_chance;
