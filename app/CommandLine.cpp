@@ -4,8 +4,8 @@
 
 #include "app/console/Failure.h"
 #include "app/console/JsonOutput.h"
-#include "app/settings/SettingsTable.h"
 #include "app/edl/ProjectFramerate.h"
+#include "app/settings/SettingsTable.h"
 #include "core/settings/Settings.h"
 
 #include <CLI/CLI.hpp>

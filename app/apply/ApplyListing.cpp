@@ -4,8 +4,8 @@
 
 #include "app/console/Columns.h"
 #include "app/console/Printable.h"
-#include "app/settings/SettingsTable.h"
 #include "app/console/Wording.h"
+#include "app/settings/SettingsTable.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 

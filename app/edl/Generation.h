@@ -2,8 +2,8 @@
 
 #pragma once
 
-#include "app/settings/SettingsTable.h"
 #include "app/edl/EdlLoader.h"
+#include "app/settings/SettingsTable.h"
 
 #include <string>
 #include <vector>

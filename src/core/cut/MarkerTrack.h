@@ -15,10 +15,10 @@ namespace cadrel::core {
 /// A track of markers in the project: that of a kind of spots, that of the stretches which were carried over, or that of the
 /// user's memos. A new kind of spot is a MarkerKind and a line of the table below.
 struct MarkerTrack {
-    std::int32_t kind;                 ///< of the entries that are written there, a MarkerKind; NoKind where none is
-    std::int32_t role;                 ///< the number that is stored with the track
-    const wchar_t* name;               ///< not translated
-    bool (Settings::*setting)() const; ///< what switches it on; null: it is always on
+    std::int32_t kind;               ///< of the entries that are written there, a MarkerKind; NoKind where none is
+    std::int32_t role;               ///< the number that is stored with the track
+    const wchar_t* name;             ///< not translated
+    Option<bool> Settings::*setting; ///< what switches it on; null: it is always on
 
     static constexpr std::int32_t NoKind = 0;
 

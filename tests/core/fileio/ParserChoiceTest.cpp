@@ -5,8 +5,8 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
-#include "tests/core/TestProject.h"
-#include "tests/util/TempFolder.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 
