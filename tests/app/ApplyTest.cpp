@@ -697,6 +697,23 @@ TEST(Apply, ASecondRunTellsItsOwnMarkersAlone)
     EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
 }
 
+TEST(Apply, EventsOfTheNewCutThatStandNowhereDoNotStopARun)
+{
+    const Scene scene;
+    const auto newFile = scene.folder.write(
+        "faulty.edl", newCut() + "005  B010  V  D 012  05:00:00:00 05:00:01:00 01:00:40:00 01:00:39:00\n" +
+                          cut("006", "B011", "05:00:00:00 05:00:01:00", "01:00:70:00 01:00:80:00") +
+                          cut("007", "B012", "05:00:00:00 05:00:00:00", "01:00:45:00 01:00:45:00"));
+
+    const Outcome outcome =
+        runCadrel({"apply", scene.project, "--old", scene.oldFile, "--new", newFile, "--json", "-"});
+
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+    const json report = json::parse(outcome.out);
+    EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
+    EXPECT_EQ(markersOf(report, "Dissolve/Wipe"), Words());
+}
+
 TEST(Apply, ABrokenModelIsToldOfAndReplaced)
 {
     const Scene scene;

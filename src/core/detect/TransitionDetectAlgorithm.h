@@ -7,7 +7,8 @@
 namespace cadrel::core {
 
 /// Finds the dissolves and wipes of the new EDL that stand at no such place in the old one and lie inside no change
-/// event. A marker is as long as the transition, whose duration must lie within a day. Can't be cancelled.
+/// event. Passes over events whose place in the programme can't be told. A marker is as long as the transition, whose
+/// duration must lie within a day. Can't be cancelled.
 class TransitionDetectAlgorithm : public CadrelInformationAlgorithm {
 public:
     std::vector<MarkerEntry> detect(const CutList& cuts, const CadrelRunState& state,
