@@ -33,7 +33,7 @@ enum class ListSide : std::int32_t { Source = 0, Destination = 1 };
 ///
 /// A bulk edit stops listening to the events, does its work, listens again and sends one EventListChangeContext with
 /// the list's kind. What has been done before a failure stays, and a list whose bulk edit failed has stopped
-/// listening to its events.
+/// listening to its events, except where an edit says otherwise.
 class EventList : public serialize::Serializable,
                   public ChangeContextNotificationBase,
                   public ChangeContextListenerInterface {
@@ -98,7 +98,7 @@ public:
     /// Reads a CMX EDL behind the present events, or in their place when not `append`. `framerate` receives the rate
     /// that the file shows. `renameBRolls` gives a roll whose name without its last letter "B" is in the file that
     /// shorter name. Throws what the reader returns, Result::FileAccessFailed for a file that can't be read; the list
-    /// stays cleared when not `append`.
+    /// stays cleared when not `append`. Throws Result::NotAvailable without a FramerateProvider, with nothing changed.
     void load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
               bool acceptAudioChannels);
     /// Without renaming B-rolls and without audio.
@@ -116,7 +116,7 @@ public:
     /// Undoes earlier healing of the selected events and heals them anew by `healMode` (Settings::HealMode) against
     /// the inserts of `referenceList`. The list is sorted by DST IN and numbered from 1 afterwards, the healed events
     /// named by their order. Members of a healed event whose timecodes have become invalid are kept as they are. Throws
-    /// what HealProcessing throws; no event is lost then.
+    /// what HealProcessing throws; no event is lost then, and the list goes on listening.
     void heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode);
     /// Whether `heal` would change the number of events. Changes nothing. False for a selection with gaps in this list.
     bool canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const;
@@ -140,6 +140,7 @@ private:
     void notifyListeners();
     TimecodeRange range(ListSide side) const;
     void shift(ListSide side, const Timecode& offset, bool forward);
+    void healSelection(const EventList& selection, const EventList& referenceList, std::int32_t healMode);
 
     std::vector<std::shared_ptr<EventBase>> m_events;
     std::int32_t m_listKind;

@@ -4,6 +4,7 @@
 #include "core/edl/EventList.h"
 #include "core/fileio/CmxParser.h"
 #include "core/fileio/CmxWriter.h"
+#include "core/time/Timecode.h"
 #include "util/Result.h"
 
 #include <algorithm>
@@ -47,6 +48,8 @@ void renameBRollsOf(const EventList& list)
 void EventList::load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
                      bool acceptAudioChannels)
 {
+    if (!Timecode::framerateProvider())
+        throw Result::NotAvailable;
     if (!append)
         clear();
     EventList loaded;
