@@ -5,6 +5,7 @@
 #include "standin/project/Envelope.h"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 
 using namespace Velmark;
@@ -99,6 +100,21 @@ void leaveOutIfNeedless(CurvePoints& run, const Counted<AutomationPoint>& point)
         run.erase(found);
 }
 
+/// The first of the points in and at a range that has the value of the last.
+const Counted<AutomationPoint>& firstLikeLast(const PointsAround& around)
+{
+    const std::array runs{&around.atStart, &around.within, &around.atEnd};
+    const auto isThere = [](const CurvePoints* run) { return !run->empty(); };
+    const double value = (*std::find_if(runs.rbegin(), runs.rend(), isThere))->back()->value();
+    for (const CurvePoints* const run : runs) {
+        for (const Counted<AutomationPoint>& point : *run) {
+            if (std::abs(point->value() - value) <= SameValue)
+                return point;
+        }
+    }
+    return runs.back()->back();
+}
+
 } // namespace
 
 CurvePoints readCurve(const Envelope& curve, double start, double end)
@@ -157,6 +173,11 @@ void replaceCurve(Envelope& curve, double start, double end, const CurvePoints& 
         leaveOutIfNeedless(run, outerStart);
     if (isHoldingPoint(outerEnd))
         leaveOutIfNeedless(run, outerEnd);
+    // The end of the range may be far from all else, and what is edited between it and there would bend.
+    if (run.size() == 1 && run.front() == outerEnd && isHoldingPoint(outerEnd)) {
+        outerEnd = firstLikeLast(around);
+        run.front() = outerEnd;
+    }
 
     const auto stays = [&](const Counted<AutomationPoint>& point) {
         return (point == outerStart || point == outerEnd) && std::ranges::find(run, point) != run.end();
