@@ -5,7 +5,6 @@
 #include "standin/project/Envelope.h"
 
 #include <algorithm>
-#include <array>
 #include <cmath>
 
 using namespace Velmark;
@@ -100,19 +99,16 @@ void leaveOutIfNeedless(CurvePoints& run, const Counted<AutomationPoint>& point)
         run.erase(found);
 }
 
-/// The first of the points in and at a range that has the value of the last.
-const Counted<AutomationPoint>& firstLikeLast(const PointsAround& around)
+/// The first of the points in and at a range that has a value; null when none has it.
+Counted<AutomationPoint> firstWithValue(const PointsAround& around, double value)
 {
-    const std::array runs{&around.atStart, &around.within, &around.atEnd};
-    const auto isThere = [](const CurvePoints* run) { return !run->empty(); };
-    const double value = (*std::find_if(runs.rbegin(), runs.rend(), isThere))->back()->value();
-    for (const CurvePoints* const run : runs) {
-        for (const Counted<AutomationPoint>& point : *run) {
+    for (const CurvePoints* const stood : {&around.atStart, &around.within, &around.atEnd}) {
+        for (const Counted<AutomationPoint>& point : *stood) {
             if (std::abs(point->value() - value) <= SameValue)
                 return point;
         }
     }
-    return runs.back()->back();
+    return nullptr;
 }
 
 } // namespace
@@ -173,10 +169,13 @@ void replaceCurve(Envelope& curve, double start, double end, const CurvePoints& 
         leaveOutIfNeedless(run, outerStart);
     if (isHoldingPoint(outerEnd))
         leaveOutIfNeedless(run, outerEnd);
-    // The end of the range may be far from all else, and what is edited between it and there would bend.
-    if (run.size() == 1 && run.front() == outerEnd && isHoldingPoint(outerEnd)) {
-        outerEnd = firstLikeLast(around);
-        run.front() = outerEnd;
+    // The one point that is left may be far from all else, and what is edited between it and there would bend.
+    if (run.size() == 1 && (isHoldingPoint(run.front()) || run.front() == around.behind)) {
+        const auto kept = firstWithValue(around, run.front()->value());
+        if (kept && run.front() == outerEnd)
+            run = {outerEnd = kept};
+        else if (kept && !isHoldingPoint(kept) && run.front() == around.behind)
+            run = {outerEnd = kept, around.behind};
     }
 
     const auto stays = [&](const Counted<AutomationPoint>& point) {

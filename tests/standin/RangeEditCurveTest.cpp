@@ -386,6 +386,18 @@ TEST(AutomationInRanges, DeletingAllOfACurveThatIsOneValueOutsideLeavesTheFirstP
     EXPECT_EQ(film.volumeOf(film.track), "15=0.25");
 }
 
+TEST(AutomationInRanges, WritingOverTheFirstPointOfAConstantCurveLeavesItWhereTheOtherMayBeFar)
+{
+    Film film;
+    film.addVolume(film.track, {{5, 0.25f}, {86405, 0.25f}});
+
+    film.copyRange({film.track}, 20, 40, 0);
+    EXPECT_EQ(film.volumeOf(film.track), "5=0.25 86405=0.25");
+    film.deleteRange(86400, 172800);
+
+    EXPECT_EQ(film.volumeOf(film.track), "5=0.25");
+}
+
 TEST(AutomationInRanges, ACurveThatHasBecomeConstantIsWrittenToAsBefore)
 {
     Film film;
