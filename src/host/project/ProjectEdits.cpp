@@ -336,12 +336,13 @@ void Project::extendProjectEnd(bool active)
     if (active)
         std::erase_if(tracks, [](const Track& track) { return !track.hasChanged(); });
     const double end = offset + dayAfter(latestEnd(tracks, offset, 0.0));
-    const double present = projectEnd();
-    if (!(end > present))
+    if (!(end > projectEnd()))
         return;
+    // Without the origin, so that it comes back to the last bit.
+    const double present = root()->getEnd(nullptr);
     requireOk(m_document->setProjectEnd(end - timeOrigin()));
     if (!m_model.hasProperty(core::PropertyKey::ProjectEnd))
-        m_model.setProperty(core::PropertyKey::ProjectEnd, core::Variant(present - timeOrigin()));
+        m_model.setProperty(core::PropertyKey::ProjectEnd, core::Variant(present));
 }
 
 void Project::restoreProjectEnd()
