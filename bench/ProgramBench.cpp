@@ -16,6 +16,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
+#include <fstream>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -91,6 +92,37 @@ std::vector<std::string> generateCommand(const std::string& program, const std::
     return {program, "generate", "--old", stem + "_old.edl", "--new", stem + "_new.edl", "-o", stem + "_change.edl"};
 }
 
+/// A project whose one track has so many clips, each half as long as all of them together.
+void writeStackedProject(const std::string& path, int clipCount)
+{
+    constexpr double Length = 1000.0;
+    std::ofstream file(path);
+    file << R"({"format": "stage", "version": 1, "framesPerSecond": 24, "dropFrame": false, "pulledDown": false,
+"timeOrigin": 0, "end": 0, "position": 0, "leftLocator": 0, "rightLocator": 0, "cycleStart": 0, "cycleEnd": 0,
+"pool": [{"number": 1, "kind": "audio", "name": "take", "path": "take.wav", "length": 1000}],
+"tracks": [{"kind": "audio", "name": "DIA", "events": [)";
+    for (int index = 0; index < clipCount; ++index) {
+        const double start = Length / 2 * index / clipCount;
+        file << (index == 0 ? "\n" : ",\n") << R"({"kind": "clip", "clip": 1, "start": )" << start << R"(, "end": )"
+             << start + Length / 2 << "}";
+    }
+    file << "]}]}\n";
+    if (!file.flush())
+        throw std::runtime_error("Cannot write " + path);
+}
+
+/// Carries such a project over to a cut of 40 shots with a few changes.
+std::vector<std::string> applyCommand(const std::string& program, const std::filesystem::path& folder, int clipCount)
+{
+    const std::string stem = (folder / ("stacked_" + std::to_string(clipCount))).string();
+    const Cut oldCut = makeCut(40);
+    writeEdl(stem + "_old.edl", oldCut);
+    writeEdl(stem + "_new.edl", recut(oldCut, 4));
+    writeStackedProject(stem + ".stage", clipCount);
+    return {program,           "apply", stem + ".stage",     "--old",    stem + "_old.edl", "--new",
+            stem + "_new.edl", "-o",    stem + "_new.stage", "--summary"};
+}
+
 bool run(const std::string& program, const std::filesystem::path& folder)
 {
     std::filesystem::create_directories(folder);
@@ -102,6 +134,8 @@ bool run(const std::string& program, const std::filesystem::path& folder)
 
     const auto [listSeconds, wcSeconds] = compare({program, "list", listed, "--summary"}, {"wc", listed});
     const auto [largeSeconds, smallSeconds] = compare(large, small);
+    const auto [manySeconds, fewSeconds] =
+        compare(applyCommand(program, folder, 20'000), applyCommand(program, folder, 5'000));
     const double megabytes = measure({program, "list", million, "--summary"}).megabytes;
     std::filesystem::remove(million);
 
@@ -112,6 +146,8 @@ bool run(const std::string& program, const std::filesystem::path& folder)
     bool kept = report("list --summary against wc", listSeconds / wcSeconds, 3, "x");
     kept &= report("generate, 100,000 events, 1,000 changes", largeSeconds, 1, "s");
     kept &= report("generate, 100,000 events against 10,000", largeSeconds / smallSeconds, 14, "x");
+    kept &= report("apply, 20,000 clips that overlap on one track", manySeconds, 8, "s");
+    kept &= report("apply, 20,000 such clips against 5,000", manySeconds / fewSeconds, 7, "x");
     kept &= report("list --summary of 1,000,000 events, most memory", megabytes, 900, "MB");
     return kept;
 }

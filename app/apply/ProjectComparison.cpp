@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <cmath>
 #include <iterator>
+#include <limits>
 #include <optional>
 #include <tuple>
 #include <utility>
@@ -59,6 +60,43 @@ double orNothing(double seconds)
     return isShorterThan(0.0, seconds) ? seconds : 0.0;
 }
 
+/// Stretches of one line, of which those that hold another are found without a walk over all.
+class Stretches {
+public:
+    void add(double start, Fate& fate) { m_stretches.push_back({start, start + fate.before.length(), 0.0, &fate}); }
+    /// Before anything is looked for. Those that start together keep their order.
+    void sort()
+    {
+        std::stable_sort(m_stretches.begin(), m_stretches.end(),
+                         [](const Stretch& a, const Stretch& b) { return a.start < b.start; });
+        double reach = std::numeric_limits<double>::lowest();
+        for (Stretch& stretch : m_stretches)
+            stretch.reach = reach = std::max(reach, stretch.end);
+    }
+    /// Of those that hold the stretch, the last; null without one.
+    Fate* holding(double start, double end) const
+    {
+        auto after = std::partition_point(m_stretches.begin(), m_stretches.end(), [start](const Stretch& stretch) {
+            return !isShorterThan(start, stretch.start);
+        });
+        while (after != m_stretches.begin() && !isShorterThan((--after)->reach, end)) {
+            if (!isShorterThan(after->end, end))
+                return after->fate;
+        }
+        return nullptr;
+    }
+
+private:
+    struct Stretch {
+        double start;
+        double end;
+        double reach; ///< the latest end up to here
+        Fate* fate;
+    };
+
+    std::vector<Stretch> m_stretches;
+};
+
 /// Finds the former clip or marker of a track from which a piece has come.
 class Origins {
 public:
@@ -70,65 +108,97 @@ public:
     /// The fates must not move in memory while this is used.
     explicit Origins(std::vector<Fate>& fates)
     {
+        std::map<Key, std::vector<Fate*>> groups;
         for (Fate& fate : fates)
-            m_groups[keyOf(fate.before)].emplace(syncOf(fate.before), &fate);
+            groups[keyOf(fate.before)].push_back(&fate);
+        for (auto& [key, group] : groups) {
+            if (std::get<Placement::Kind>(key) == Placement::Kind::Clip)
+                m_clips.emplace(key, linesOf(std::move(group)));
+            else
+                m_markers.emplace(key, byStart(group));
+        }
     }
 
     /// What stood `shift` earlier and holds the piece; of clips else the one nearest to that. Nothing when there is none.
     /// Without a shift nothing goes to where the piece stands, unless a clip hangs over.
     std::optional<Origin> find(const Placement& now, std::optional<double> shift) const
     {
-        const auto group = m_groups.find(keyOf(now));
-        if (group == m_groups.end())
-            return std::nullopt;
         if (now.kind == Placement::Kind::Clip)
-            return nearestClip(group->second, now, shift.value_or(0.0));
-        return shift ? markerAt(group->second, now, *shift) : std::nullopt;
+            return nearestClip(now, shift.value_or(0.0));
+        return shift ? markerAt(now, *shift) : std::nullopt;
     }
 
 private:
     using Key = std::tuple<Placement::Kind, const standin::MediaClip*, std::u16string>;
-    using Sources = std::multimap<double, Fate*>;
+    /// The clips that are in sync with one another, by where they begin in their file.
+    struct Line {
+        double sync;
+        Stretches clips;
+    };
 
     static Key keyOf(const Placement& placement) { return {placement.kind, placement.clip, placement.name}; }
     /// Where the clip would begin if all of it were there.
     static double syncOf(const Placement& placement) { return placement.start - placement.offset; }
-    static bool holds(const Placement& before, const Piece& piece)
+
+    static Stretches byStart(const std::vector<Fate*>& markers)
     {
-        return !isShorterThan(piece.from, 0.0) && !isShorterThan(before.length(), piece.from + piece.now.length());
+        Stretches stretches;
+        for (Fate* const fate : markers)
+            stretches.add(fate->before.start, *fate);
+        stretches.sort();
+        return stretches;
+    }
+
+    static std::vector<Line> linesOf(std::vector<Fate*> clips)
+    {
+        // Of clips that are alike in everything the first is to be found.
+        std::reverse(clips.begin(), clips.end());
+        std::stable_sort(clips.begin(), clips.end(),
+                         [](const Fate* a, const Fate* b) { return syncOf(a->before) < syncOf(b->before); });
+        std::vector<Line> lines;
+        for (Fate* const fate : clips) {
+            if (lines.empty() || isShorterThan(lines.back().sync, syncOf(fate->before)))
+                lines.push_back({syncOf(fate->before), {}});
+            lines.back().clips.add(fate->before.offset, *fate);
+        }
+        for (Line& line : lines)
+            line.clips.sort();
+        return lines;
     }
 
     /// A piece of a marker doesn't say how far into the marker it begins, so only the shift is used.
-    static std::optional<Origin> markerAt(const Sources& sources, const Placement& now, double shift)
+    std::optional<Origin> markerAt(const Placement& now, double shift) const
     {
+        const auto group = m_markers.find(keyOf(now));
         const double start = now.start - shift;
-        for (auto behind = sources.upper_bound(start + SameInstant); behind != sources.begin();) {
-            Fate* const fate = (--behind)->second;
-            const Piece piece{now, start - fate->before.start, shift};
-            if (holds(fate->before, piece))
-                return Origin{fate, piece};
-        }
-        return std::nullopt;
+        Fate* const fate = group == m_markers.end() ? nullptr : group->second.holding(start, start + now.length());
+        if (!fate)
+            return std::nullopt;
+        return Origin{fate, {now, start - fate->before.start, shift}};
     }
 
-    static std::optional<Origin> nearestClip(const Sources& sources, const Placement& now, double shift)
+    std::optional<Origin> nearestClip(const Placement& now, double shift) const
     {
+        const auto group = m_clips.find(keyOf(now));
+        if (group == m_clips.end())
+            return std::nullopt;
+        const std::vector<Line>& lines = group->second;
         const double expected = syncOf(now) - shift;
-        auto right = sources.lower_bound(expected);
+        auto right = std::partition_point(lines.begin(), lines.end(),
+                                          [expected](const Line& line) { return line.sync < expected; });
         auto left = right;
-        while (left != sources.begin() || right != sources.end()) {
-            const bool goesLeft =
-                right == sources.end() ||
-                (left != sources.begin() && expected - std::prev(left)->first <= right->first - expected);
-            const auto& [sync, fate] = goesLeft ? *--left : *right++;
-            const Piece piece{now, now.offset - fate->before.offset, syncOf(now) - sync};
-            if (holds(fate->before, piece))
-                return Origin{fate, piece};
+        while (left != lines.begin() || right != lines.end()) {
+            const bool goesLeft = right == lines.end() ||
+                                  (left != lines.begin() && expected - std::prev(left)->sync <= right->sync - expected);
+            const Line& line = goesLeft ? *--left : *right++;
+            if (Fate* const fate = line.clips.holding(now.offset, now.offset + now.length()))
+                return Origin{fate, {now, now.offset - fate->before.offset, syncOf(now) - syncOf(fate->before)}};
         }
         return std::nullopt;
     }
 
-    std::map<Key, Sources> m_groups;
+    std::map<Key, std::vector<Line>> m_clips;
+    std::map<Key, Stretches> m_markers;
 };
 
 /// A run carries nothing to the same place twice, so the second of two equal markers there is new.

@@ -210,9 +210,14 @@ void Host::notify(const core::ChangeContext& context)
 void Host::settleAfterUndo(Project& project)
 {
     project.findLockedTracks();
-    if (project.model().isPreviewActive() || !project.hasLockTracks())
-        return;
     FirstFailure failure;
+    // A preview that has come back needs its room, and one that has gone doesn't.
+    if (!project.model().isPreviewActive() || project.hasPreviewOffset())
+        failure.ofStep([&] { project.extendProjectEnd(false); });
+    if (project.model().isPreviewActive() || !project.hasLockTracks()) {
+        failure.raise();
+        return;
+    }
     failure.ofStep([&] { restoreCycles(); });
     failure.ofStep([&] { project.setTracksLocked(false); });
     project.releaseLockTracks();

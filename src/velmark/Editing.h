@@ -75,7 +75,8 @@ public:
     /// Writes it at `destination` over what is there, as copyRange does. `reserved` is 0.
     virtual int32 paste(IProjectDocument* project, FUnknown* clipboard, int32 reserved, double destination) = 0;
     /// Empties the range on every track but rulers. What hangs over its edges is cut; automation points in it go, with a
-    /// point at an edge where the curve would change outside. `reserved` is 0.
+    /// point at an edge where the curve would change outside. Of a curve that has one value outside and no point there,
+    /// one point with that value stays where it stands. `reserved` is 0.
     virtual int32 deleteRange(IProjectDocument* project, int32 reserved, double start, double end) = 0;
     /// Puts a step of the module's own in its place among the edits. The transaction takes a reference; execute() isn't
     /// called.

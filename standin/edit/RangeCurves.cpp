@@ -99,6 +99,18 @@ void leaveOutIfNeedless(CurvePoints& run, const Counted<AutomationPoint>& point)
         run.erase(found);
 }
 
+/// The first of the points in and at a range that has a value; null when none has it.
+Counted<AutomationPoint> firstWithValue(const PointsAround& around, double value)
+{
+    for (const CurvePoints* const stood : {&around.atStart, &around.within, &around.atEnd}) {
+        for (const Counted<AutomationPoint>& point : *stood) {
+            if (std::abs(point->value() - value) <= SameValue)
+                return point;
+        }
+    }
+    return nullptr;
+}
+
 } // namespace
 
 CurvePoints readCurve(const Envelope& curve, double start, double end)
@@ -157,6 +169,14 @@ void replaceCurve(Envelope& curve, double start, double end, const CurvePoints& 
         leaveOutIfNeedless(run, outerStart);
     if (isHoldingPoint(outerEnd))
         leaveOutIfNeedless(run, outerEnd);
+    // The one point that is left may be far from all else, and what is edited between it and there would bend.
+    if (run.size() == 1 && (isHoldingPoint(run.front()) || run.front() == around.behind)) {
+        const auto kept = firstWithValue(around, run.front()->value());
+        if (kept && run.front() == outerEnd)
+            run = {outerEnd = kept};
+        else if (kept && !isHoldingPoint(kept) && run.front() == around.behind)
+            run = {outerEnd = kept, around.behind};
+    }
 
     const auto stays = [&](const Counted<AutomationPoint>& point) {
         return (point == outerStart || point == outerEnd) && std::ranges::find(run, point) != run.end();

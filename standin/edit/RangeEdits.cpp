@@ -7,6 +7,8 @@
 #include "standin/project/Project.h"
 
 #include <algorithm>
+#include <cstdint>
+#include <unordered_map>
 
 using namespace Velmark;
 
@@ -63,15 +65,17 @@ void clearEvents(Track& track, double start, double end)
     }
 }
 
-/// Null when no event goes on where this one ends.
-Event* continuationOf(const Event& event)
+/// Those on a track that may be pieces of one event, in order.
+using Pieces = std::vector<Counted<Event>>;
+
+/// Null when none of the pieces goes on where this one ends.
+Event* continuationOf(const Event& event, const Pieces& pieces)
 {
-    const Container& track = *event.parent();
-    for (Node* child = track.firstChildAfter(event.end() - SameInstant);
-         child && child->start() < event.end() + SameInstant; child = track.childBehind(*child)) {
-        auto* const next = static_cast<Event*>(child);
-        if (next != &event && event.isContinuedBy(*next))
-            return next;
+    auto piece = std::ranges::partition_point(
+        pieces, [&](const Counted<Event>& other) { return other->start() <= event.end() - SameInstant; });
+    for (; piece != pieces.end() && (*piece)->start() < event.end() + SameInstant; ++piece) {
+        if (piece->get() != &event && (*piece)->parent() && event.isContinuedBy(**piece))
+            return piece->get();
     }
     return nullptr;
 }
@@ -132,14 +136,18 @@ bool joinPieces(const std::vector<Track*>& tracks, double start, double end)
 {
     bool joined = false;
     for (Track* const track : tracks) {
-        std::vector<Counted<Event>> events;
-        track->visitTouching(start - SameInstant, end + SameInstant, [&](Node& child) {
+        Pieces events;
+        std::unordered_map<std::uint64_t, Pieces> piecesOf;
+        // What goes on at the end begins less than two instants after it.
+        track->visitTouching(start - SameInstant, end + 2.0 * SameInstant, [&](Node& child) {
             events.push_back(Counted<Event>::share(static_cast<Event*>(&child)));
+            piecesOf[events.back()->origin()].push_back(events.back());
         });
         for (const Counted<Event>& event : events) {
+            const Pieces& pieces = piecesOf[event->origin()];
             // Those to the left may have taken it in.
             while (event->parent() && event->end() > start - SameInstant && event->end() < end + SameInstant) {
-                Event* const next = continuationOf(*event);
+                Event* const next = continuationOf(*event, pieces);
                 if (!next)
                     break;
                 event->join(*next);

@@ -32,6 +32,8 @@ public:
     /// A new event, not inserted: this one cut to `start` to `end`, which are seconds in its container and lie within it. It
     /// stands at `start`. All travels with it: name, attributes, selection, source offset, the content of a part.
     Velmark::Counted<Event> cutOut(double start, double end) const;
+    /// The same number for all pieces of one event, and for them alone.
+    std::uint64_t origin() const { return m_origin; }
     /// Whether `next`, which has to begin where this one ends, is a piece of the same event and the one that followed in it,
     /// with equal name and attributes.
     bool isContinuedBy(const Event& next) const;

@@ -15,6 +15,7 @@
 #include <nlohmann/json.hpp>
 #include <stdexcept>
 #include <string_view>
+#include <sys/resource.h>
 
 namespace {
 
@@ -695,6 +696,68 @@ TEST(Apply, ASecondRunTellsItsOwnMarkersAlone)
     EXPECT_EQ(markersOf(report, "Destination"),
               (Words{"0-10 Event: 1 - A001 ", "10-18 Event: 2 - A002 ", "22-32 Event: 3 - A003 "}));
     EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
+}
+
+TEST(Apply, EventsOfTheNewCutThatStandNowhereDoNotStopARun)
+{
+    const Scene scene;
+    const auto newFile = scene.folder.write(
+        "faulty.edl", newCut() + "005  B010  V  D 012  05:00:00:00 05:00:01:00 01:00:40:00 01:00:39:00\n" +
+                          cut("006", "B011", "05:00:00:00 05:00:01:00", "01:00:70:00 01:00:80:00") +
+                          cut("007", "B012", "05:00:00:00 05:00:00:00", "01:00:45:00 01:00:45:00"));
+
+    const Outcome outcome =
+        runCadrel({"apply", scene.project, "--old", scene.oldFile, "--new", newFile, "--json", "-"});
+
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+    const json report = json::parse(outcome.out);
+    EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
+    EXPECT_EQ(markersOf(report, "Dissolve/Wipe"), Words());
+}
+
+/// A project with one track on which so many clips of one take lie: from the first half second of the film on, one after the
+/// other and in sync, or all on top of one another.
+std::string manyClips(int count, bool isStacked)
+{
+    std::string events;
+    for (int index = 0; index < count; ++index) {
+        const double offset = isStacked ? 0.0 : 29.0 * index / count;
+        const double length = isStacked ? 29.0 : 29.0 / count;
+        events += std::string(index == 0 ? "" : ",\n") + R"({"kind": "clip", "start": )" + number(3600.5 + offset) +
+                  R"(, "end": )" + number(3600.5 + offset + length) + R"(, "clip": 1, "offset": )" + number(offset) +
+                  R"(, "name": "take"})";
+    }
+    std::string text = projectWith(R"({"kind": "audio", "name": "DIA", "events": [)" + events + "]}");
+    const std::string noPool = R"("pool": [])";
+    return text.replace(
+        text.find(noPool), noPool.size(),
+        R"("pool": [{"number": 1, "kind": "audio", "name": "take", "path": "take.wav", "length": 60}])");
+}
+
+TEST(Apply, NoRunIsQuadraticInClipsOfOneTake)
+{
+    const TempFolder folder;
+    const auto oldFile = folder.write("old.edl", oldCut());
+    const auto newFile = folder.write("new.edl", newCut());
+    // Of the processor, so that other programs don't count.
+    const auto secondsOfChildren = [] {
+        rusage usage{};
+        getrusage(RUSAGE_CHILDREN, &usage);
+        return static_cast<double>(usage.ru_utime.tv_sec) + 1e-6 * static_cast<double>(usage.ru_utime.tv_usec);
+    };
+    for (const bool isStacked : {false, true}) {
+        const auto secondsToApply = [&](int count) {
+            const std::string project = folder.write("many.stage", manyClips(count, isStacked));
+            const double before = secondsOfChildren();
+            EXPECT_EQ(runCadrel({"apply", project, "--old", oldFile, "--new", newFile, "--summary"}).status, 0);
+            return secondsOfChildren() - before;
+        };
+
+        const double few = std::max(secondsToApply(4000), secondsToApply(4000));
+        const double many = std::min(secondsToApply(16000), secondsToApply(16000));
+
+        EXPECT_LT(many, 8.0 * few) << isStacked;
+    }
 }
 
 TEST(Apply, ABrokenModelIsToldOfAndReplaced)

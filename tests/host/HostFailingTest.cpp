@@ -91,7 +91,10 @@ public:
             track->setLocked(false);
             track->removeAttribute(AttributeKey::LockState);
         }
-        return host.dump();
+        std::string text = host.dump();
+        // The end of the project follows the preview and stands in no entry of the undo list.
+        const std::size_t end = text.find("\n  \"end\": ");
+        return text.erase(end, text.find('\n', end + 1) - end);
     }
     bool isAnyTrackLocked()
     {

@@ -391,6 +391,46 @@ TEST_P(HostPreviewTest, LocksTheTracksThatItShows)
     EXPECT_TRUE(isLocked(own)) << "That is the user's lock.";
 }
 
+TEST_P(HostPreviewTest, LeavesTheProjectEndWhereItWas)
+{
+    const double end = host.project.getEnd(nullptr);
+    previewAll();
+    ASSERT_GT(host.project.getEnd(nullptr), Day);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+}
+
+TEST_P(HostPreviewTest, LeavesTheProjectEndWhereItWasWhenTheProjectIsSavedInBetween)
+{
+    const double end = host.project.getEnd(nullptr);
+    previewAll();
+    ASSERT_EQ(adapter().projectStoring(host.document()), ResultOk);
+    host.disconnect();
+    host.connect();
+    ASSERT_TRUE(adapter().isPreviewActive());
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+}
+
+TEST_P(HostPreviewTest, TakesItsRoomAlongWhenItIsUndoneAndRedone)
+{
+    const double end = host.project.getEnd(nullptr);
+    previewAll();
+    const double extended = host.project.getEnd(nullptr);
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+    ASSERT_TRUE(host.redo());
+    EXPECT_EQ(host.project.getEnd(nullptr), extended);
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+}
+
 TEST_P(HostPreviewTest, LeavesALockAloneThatTheUserHasSetSince)
 {
     const auto lock = [&] { query<ITrackNode>(track)->setFlag(TrackFlag::Lock, true); };

@@ -14,7 +14,12 @@
 #include "standin/edit/EditService.h"
 #include "standin/edit/ProjectManager.h"
 #include "standin/file/ProjectFile.h"
+#include "standin/project/AutomationPoint.h"
+#include "standin/project/ClipEvent.h"
+#include "standin/project/Envelope.h"
+#include "standin/project/Marker.h"
 #include "standin/project/Project.h"
+#include "standin/project/Track.h"
 #include "tests/support/standin/Heard.h"
 #include "tests/support/standin/RandomProject.h"
 #include "velmark/Attributes.h"
@@ -46,6 +51,9 @@ using Tracks = std::vector<standin::Track*>;
 /// No random film, and nothing that is carried over in it, reaches as far, in seconds of the host.
 constexpr double EndOfFilm = 1000.0;
 
+/// A curve that random projects have no points on.
+constexpr std::int32_t ConstantCurve = 7;
+
 /// A change event at normal speed, in seconds of the host.
 struct Carried {
     double source;
@@ -67,6 +75,8 @@ public:
             {30000.0 / 1001.0, FrameRateInfo::Flag::PulledDown | FrameRateInfo::Flag::DropFrame}};
         project.setFrameRate(m_chance.oneOf(Rates));
         application.activateProject(&project);
+        addConstantCurves();
+        addStacks();
         adapter = makeCounted<Host>(application.context());
         compose();
     }
@@ -170,6 +180,39 @@ public:
     }
 
 private:
+    /// One point each.
+    void addConstantCurves()
+    {
+        for (standin::Track* const track : project.allTracks()) {
+            if (!track->hasAutomation() || m_chance.oneIn(3))
+                continue;
+            const auto point = makeCounted<standin::AutomationPoint>();
+            const auto time = static_cast<double>(m_chance.below(100));
+            point->setSpan(time, time);
+            point->setValue(0.25);
+            point->insertInto(track->curve(ConstantCurve));
+        }
+    }
+
+    /// Ranges and clips that stand on top of one another.
+    void addStacks()
+    {
+        for (standin::Track* const track : project.allTracks()) {
+            if (track->isFolder() || track->kind() == standin::Track::Kind::Ruler || m_chance.oneIn(3))
+                continue;
+            const auto start = static_cast<double>(m_chance.below(60));
+            for (std::uint64_t count = m_chance.below(6); count > 0; --count) {
+                Counted<standin::Event> event;
+                if (track->kind() == standin::Track::Kind::Marker)
+                    event = makeCounted<standin::Marker>(true);
+                else
+                    event = makeCounted<standin::ClipEvent>();
+                event->setSpan(start, start + 20.0);
+                event->insertInto(*track);
+            }
+        }
+    }
+
     void compose()
     {
         core::Settings& settings = model().settings();
@@ -254,6 +297,15 @@ bool isLevelFrom(const standin::Envelope& curve, double time)
     return true;
 }
 
+bool hasConstantPointFrom(const standin::Track& track, double time)
+{
+    for (const auto& [number, curve] : track.curves()) {
+        if (number == ConstantCurve && curve->lastChild() && curve->lastChild()->start() >= time)
+            return true;
+    }
+    return false;
+}
+
 /// Whether a curve that has points runs straight from just behind the one time to just before the other.
 bool isStraight(const standin::Envelope& curve, double start, double end)
 {
@@ -321,6 +373,7 @@ RC_GTEST_PROP(HostRunLaw, EachInstantHoldsWhatStoodAtItsSource, ())
         RC_ASSERT(track.lastEnd() < EndOfFilm);
         for (const auto& [number, curve] : track.curves())
             RC_ASSERT(isLevelFrom(*curve, EndOfFilm));
+        RC_ASSERT(!hasConstantPointFrom(track, EndOfFilm));
     }
 }
 
@@ -360,6 +413,8 @@ RC_GTEST_PROP(HostRunLaw, APreviewLeavesTheFilmAsItIs, ())
         }
     };
 
+    const double end = run.project.getEnd(nullptr);
+
     run.adapter->setPreviewActive(true);
     RC_ASSERT(run.adapter->startPreview(run.model().changeEdl(), 0, 0, 1) == Result::Ok);
     run.application.idle();
@@ -373,11 +428,13 @@ RC_GTEST_PROP(HostRunLaw, APreviewLeavesTheFilmAsItIs, ())
     }
 
     run.adapter->setPreviewActive(false);
+    RC_ASSERT(run.project.getEnd(nullptr) == end);
     for (std::size_t index = 0; index < tracks.size(); ++index) {
         // The automation too.
         for (std::size_t at = 0; at < instants.size(); ++at)
             RC_ASSERT(Heard::at(*tracks[index], instants[at]) == before[index][at]);
         RC_ASSERT(tracks[index]->lastEnd() < EndOfFilm);
+        RC_ASSERT(!hasConstantPointFrom(*tracks[index], EndOfFilm));
     }
 }
 

@@ -93,7 +93,18 @@ std::shared_ptr<EventBase> neighbourOf(const EventList& events, const std::share
 void EventList::heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode)
 {
     stopListening();
+    try {
+        healSelection(selection, referenceList, healMode);
+    } catch (...) {
+        listen();
+        throw;
+    }
+    listen();
+    notifyListeners();
+}
 
+void EventList::healSelection(const EventList& selection, const EventList& referenceList, std::int32_t healMode)
+{
     const CutMap selected(selection, Timecode::framerate());
     EventList healed = withoutHealing(*this, selected);
     const EventList untimed = takeUntimed(healed);
@@ -121,8 +132,6 @@ void EventList::heal(const EventList& selection, const EventList& referenceList,
         event->setEventNumber(number++);
     for (const auto& [event, name] : names)
         event->setRollName(name);
-    listen();
-    notifyListeners();
 }
 
 bool EventList::canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const

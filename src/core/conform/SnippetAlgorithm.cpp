@@ -19,9 +19,9 @@ namespace {
 bool isSnippet(double length, double clipLength, const CadrelPreviewState& state)
 {
     const Settings& settings = *state.settings;
-    const double frames = length * state.framerate.rate;
-    if (frames == 0.0)
+    if (length < SameInstant)
         return false;
+    const double frames = length * state.framerate.rate;
     const double threshold = settings.snippetThreshold();
     if (threshold <= frames && std::abs(threshold - frames) >= SameInstant)
         return false;

@@ -31,6 +31,12 @@ const std::string& CadrelInformationAlgorithm::nameOf(const EventBase& event, co
     return state.settings->matchBy() != MatchBy::RollName ? event.clipName() : event.rollName();
 }
 
+bool CadrelInformationAlgorithm::hasPlace(const EventBase& event)
+{
+    return !event.hasFlaw(EventFlaw::DstInUnreadable) && !event.hasFlaw(EventFlaw::DstOutUnreadable) &&
+           !event.hasFlaw(EventFlaw::TimecodeInvalid) && !event.hasFlaw(EventFlaw::TimecodeRangeInvalid);
+}
+
 std::vector<std::shared_ptr<Cut>> CadrelInformationAlgorithm::inTimeOrder(const CutList& cuts)
 {
     const auto ordered = cuts.orderedByStart();

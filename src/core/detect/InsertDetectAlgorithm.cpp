@@ -6,11 +6,8 @@
 #include "core/cut/CutList.h"
 #include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
-#include "util/Result.h"
 
 namespace cadrel::core {
-
-using util::Result;
 
 std::vector<MarkerEntry> InsertDetectAlgorithm::detect(const CutList& cuts, const CadrelRunState& state,
                                                        ProgressHandlerBase* progress) const
@@ -21,9 +18,11 @@ std::vector<MarkerEntry> InsertDetectAlgorithm::detect(const CutList& cuts, cons
 
     std::vector<MarkerEntry> entries;
     for (const auto& event : state.newEvents->events()) {
+        if (!hasPlace(*event))
+            continue;
         const SecondsRange range{event->dstIn().toSeconds(state.framerate), event->dstOut().toSeconds(state.framerate)};
-        if (range.start > range.end)
-            throw Result::InvalidArgument;
+        if (range.end - range.start < SameInstant)
+            continue;
         for (const SecondsRange& uncovered : carriedOver.uncoveredDestinationRanges(range))
             entries.push_back({uncovered.start, uncovered.end, "Insert: " + nameOf(*event, state), MarkerKind::Insert});
     }

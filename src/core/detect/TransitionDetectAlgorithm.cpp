@@ -74,6 +74,7 @@ std::vector<MarkerEntry> TransitionDetectAlgorithm::detect(const CutList& cuts, 
                                                            ProgressHandlerBase* progress) const
 {
     Transitions transitions = transitionsOf(*state.newEvents);
+    std::erase_if(transitions, [](const auto& event) { return !hasPlace(*event); });
     removeThoseAtPlacesOf(transitionsOf(*state.oldEvents), transitions);
     report(progress, 1);
 

@@ -36,7 +36,8 @@ enum class ListSide : std::int32_t { Source = 0, Destination = 1 };
 /// and announces their changes as changes of the list.
 ///
 /// A bulk edit stops listening to the events, does its work, listens again and sends one EventListChangeContext with
-/// the list's kind. After a failure, what was done before it stays, and the list no longer listens to its events.
+/// the list's kind. After a failure, what was done before it stays, and the list no longer listens to its events unless the
+/// operation says otherwise.
 class EventList : public serialize::Serializable,
                   public ChangeContextNotificationBase,
                   public ChangeContextListenerInterface {
@@ -102,7 +103,8 @@ public:
     /// Reads an EDL. Its events come after the present ones with `append`, otherwise they replace them. `framerate`
     /// receives the rate that the file shows. With `renameBRolls`, a roll "A001B" is named "A001" when the file also
     /// has a roll "A001". Throws what the reader returns, such as Result::FileAccessFailed for a file that can't be
-    /// read; without `append` the list is empty then.
+    /// read; without `append` the list is empty then. Throws
+    /// Result::NotAvailable without a FramerateProvider, with nothing changed.
     void load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
               bool acceptAudioChannels);
     /// Reads after the present events with a parser of the caller, who can ask it then what else it found in the file.
@@ -123,7 +125,7 @@ public:
     /// Undoes the healing of the selected events and heals them again by `healMode` (HealMode), with the inserts of
     /// `referenceList`. The list is sorted by DST IN and numbered from 1 afterwards, the healed events named by their
     /// order. A member of a healed event is kept as it is if its timecodes have become invalid. Throws what
-    /// HealProcessing throws; no event is lost then.
+    /// HealProcessing throws; no event is lost then, and the list goes on listening.
     void heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode);
     /// Whether `heal` would change the number of events. Changes nothing. False for a selection with gaps in this list.
     bool canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const;
@@ -147,6 +149,7 @@ private:
     void notifyListeners();
     TimecodeRange range(ListSide side) const;
     void shift(ListSide side, const Timecode& offset, bool forward);
+    void healSelection(const EventList& selection, const EventList& referenceList, std::int32_t healMode);
 
     std::vector<std::shared_ptr<EventBase>> m_events;
     std::int32_t m_listKind;

@@ -5,6 +5,7 @@
 #include "core/fileio/CmxWriter.h"
 #include "core/fileio/ParserChoice.h"
 #include "core/fileio/ParserInterface.h"
+#include "core/time/Timecode.h"
 #include "util/Result.h"
 
 #include <algorithm>
@@ -48,6 +49,8 @@ void renameBRollsOf(const EventList& list)
 void EventList::load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
                      bool acceptAudioChannels)
 {
+    if (!Timecode::framerateProvider())
+        throw Result::NotAvailable;
     if (!append)
         clear();
     load(fileName, framerate, renameBRolls, acceptAudioChannels, *fileio::parserFor(fileName));

@@ -10,6 +10,10 @@
 #include "core/settings/VfxNameMatcher.h"
 #include "core/time/SecondsRange.h"
 
+#include <cstddef>
+#include <unordered_set>
+#include <utility>
+
 namespace cadrel::core {
 
 using serialize::ByteArchive;
@@ -18,6 +22,24 @@ using util::Result;
 namespace {
 
 constexpr std::uint32_t PersistenceVersion = 1;
+
+/// The events of a programme that play from `in` to `out`, each once, in the map's order.
+std::vector<std::shared_ptr<EventBase>> eventsPlaying(const CutMap& programme, const Timecode& in, const Timecode& out)
+{
+    // Shrunk, so that a neighbour that merely touches isn't hit.
+    const double start = in.toSeconds() + SameInstant;
+    const double end = out.toSeconds() - SameInstant;
+    if (start > end)
+        throw Result::InvalidArgument;
+    std::vector<std::shared_ptr<EventBase>> events;
+    std::unordered_set<const EventBase*> known;
+    for (const auto& reference : programme.eventsInDestinationRange(start, end)) {
+        std::shared_ptr<EventBase> event(reference);
+        if (known.insert(event.get()).second)
+            events.push_back(std::move(event));
+    }
+    return events;
+}
 
 } // namespace
 
@@ -145,35 +167,35 @@ void DataModel::applyVfxHandling()
 
 EventList DataModel::oldEventsFor(const std::shared_ptr<EventBase>& changeEvent) const
 {
-    if (!isPlacedChange(changeEvent))
-        return EventList();
-    return eventsOf(m_oldEdl, changeEvent->srcIn(), changeEvent->srcOut());
+    return oldEventsFor(std::vector{changeEvent}).front();
 }
 
 EventList DataModel::newEventsFor(const std::shared_ptr<EventBase>& changeEvent) const
 {
-    if (!isPlacedChange(changeEvent))
-        return EventList();
-    return eventsOf(m_newEdl, changeEvent->dstIn(), changeEvent->dstOut());
+    return newEventsFor(std::vector{changeEvent}).front();
 }
 
-bool DataModel::isPlacedChange(const std::shared_ptr<EventBase>& event) const
+std::vector<EventList> DataModel::oldEventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const
 {
-    return m_changeEdl.contains(event) && !event->hasFlaw(EventFlaw::TimecodeInvalid) &&
-           event->srcIn() < event->srcOut() && event->dstIn() < event->dstOut();
+    return eventsFor(changeEvents, m_oldEdl, &EventBase::srcIn, &EventBase::srcOut);
 }
 
-EventList DataModel::eventsOf(const EventList& programme, const Timecode& in, const Timecode& out)
+std::vector<EventList> DataModel::newEventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const
 {
+    return eventsFor(changeEvents, m_newEdl, &EventBase::dstIn, &EventBase::dstOut);
+}
+
+std::vector<EventList> DataModel::eventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents,
+                                            const EventList& programme, TimecodeOf in, TimecodeOf out) const
+{
+    const CutMap changes(m_changeEdl, Timecode::framerate());
     const CutMap map(programme, Timecode::framerate());
-    // The range is made a little shorter, so that it doesn't include a neighbour that only touches it.
-    const double start = in.toSeconds() + SameInstant;
-    const double end = out.toSeconds() - SameInstant;
-    if (start > end)
-        throw Result::InvalidArgument;
-    EventList found;
-    for (const auto& event : map.eventsInDestinationRange(start, end))
-        found.add(std::shared_ptr<EventBase>(event));
+    std::vector<EventList> found(changeEvents.size());
+    for (std::size_t index = 0; index < changeEvents.size(); ++index) {
+        const std::shared_ptr<EventBase>& change = changeEvents[index];
+        if (changes.contains(change) && change->srcIn() < change->srcOut() && change->dstIn() < change->dstOut())
+            found[index].append(eventsPlaying(map, (change.get()->*in)(), (change.get()->*out)()));
+    }
     return found;
 }
 

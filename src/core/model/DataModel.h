@@ -15,6 +15,7 @@
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <vector>
 
 namespace cadrel::core {
 
@@ -39,6 +40,7 @@ struct PropertyKey {
         NewTableSelection = 10018,      ///< string, likewise
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
+        ProjectEnd = 10021,             ///< double, from the time origin, as it stood when the preview went on
     };
 };
 
@@ -89,10 +91,13 @@ public:
     /// row that doesn't compile, with no event touched.
     void applyVfxHandling();
     /// The events of the old EDL that a change event's source range covers, and those of the new EDL that its
-    /// destination range covers; empty for an event that isn't in the change EDL or has an empty range. Throw
+    /// destination range covers, each once; empty for what isn't a member of the change EDL or has an empty range. Throw
     /// Result::InvalidArgument for a range shorter than the tolerance of a comparison.
     EventList oldEventsFor(const std::shared_ptr<EventBase>& changeEvent) const;
     EventList newEventsFor(const std::shared_ptr<EventBase>& changeEvent) const;
+    /// The same for many change events at one go, a list for each. Every EDL is sorted once.
+    std::vector<EventList> oldEventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const;
+    std::vector<EventList> newEventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const;
     /// Works out the flaws of all events again after a change of the project's frame rate; sends one
     /// DataModelChangeContext.
     void revalidateEvents();
@@ -117,9 +122,10 @@ private:
     void send(const ChangeContext& context);
     util::Result::Type generateAndHeal(const GenerationFailureListener& onFailure);
     std::array<ChangeContextNotificationBase*, 5> sources();
-    bool isPlacedChange(const std::shared_ptr<EventBase>& event) const;
-    /// The events of an EDL that play from `in` to `out`.
-    static EventList eventsOf(const EventList& programme, const Timecode& in, const Timecode& out);
+    using TimecodeOf = const Timecode& (EventBase::*)() const;
+    /// For each change event the events of an EDL that play in its range on one side.
+    std::vector<EventList> eventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents,
+                                     const EventList& programme, TimecodeOf in, TimecodeOf out) const;
     void readMembers(serialize::ByteArchive& archive);
     void finishReading(util::Result::Type result, bool notifies);
 

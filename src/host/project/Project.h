@@ -156,7 +156,8 @@ public:
     void getApplyRange(double& start, double& end) const;
     /// Lets the host join the pieces that the cuts have left of one clip.
     void closeRange(bool onlySelected, double start, double end);
-    /// Makes room for the preview; does nothing unless preview is on. With `active` only tracks that have changed count.
+    /// While a preview is on, makes room for it; with `active` only tracks that have changed count. Without one, puts the
+    /// end of the project back where it stood before room was made, and does nothing where none was.
     void extendProjectEnd(bool active);
     core::CadrelRunState runState();
     core::CadrelPreviewState previewState();
@@ -190,6 +191,7 @@ private:
     void tellListeners(FirstFailure& failure);
     bool isPreviewing() const;
     MemoSync::Previewed previewed() const;
+    void restoreProjectEnd();
     void syncMemos(Velmark::IEditTransaction& transaction);
     void rememberMemos();
 

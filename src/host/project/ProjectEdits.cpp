@@ -310,15 +310,31 @@ void Project::closeRange(bool onlySelected, double start, double end)
 
 void Project::extendProjectEnd(bool active)
 {
-    if (!m_model.isPreviewActive())
+    if (!m_model.isPreviewActive()) {
+        restoreProjectEnd();
         return;
+    }
     const double offset = requiredOffset();
     std::vector<Track> tracks = cadrelTracks();
     if (active)
         std::erase_if(tracks, [](const Track& track) { return !track.hasChanged(); });
     const double end = offset + dayAfter(latestEnd(tracks, offset, 0.0));
-    if (end > projectEnd())
-        requireOk(m_document->setProjectEnd(end - timeOrigin()));
+    if (!(end > projectEnd()))
+        return;
+    // Without the origin, so that it comes back to the last bit.
+    const double present = root()->getEnd(nullptr);
+    requireOk(m_document->setProjectEnd(end - timeOrigin()));
+    if (!m_model.hasProperty(core::PropertyKey::ProjectEnd))
+        m_model.setProperty(core::PropertyKey::ProjectEnd, core::Variant(present));
+}
+
+void Project::restoreProjectEnd()
+{
+    core::Variant end;
+    if (m_model.getProperty(core::PropertyKey::ProjectEnd, end) != Result::Ok)
+        return;
+    requireOk(m_document->setProjectEnd(std::max(end.toDouble(), 0.0)));
+    m_model.removeProperty(core::PropertyKey::ProjectEnd);
 }
 
 bool Project::isWanted(const Track& track) const

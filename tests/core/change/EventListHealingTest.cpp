@@ -260,7 +260,7 @@ TEST(EventListHeal, WithoutAConverterForTheNamesNoEventIsLost)
     EXPECT_EQ(list.events(), events);
 }
 
-TEST(EventListHeal, AFailureLeavesTheListDeafToItsEvents)
+TEST(EventListHeal, AFailureLeavesTheListListeningToItsEvents)
 {
     const Events events = {stretch(0, 10), stretch(10, 10)};
     EventList list = listOf(events);
@@ -269,9 +269,11 @@ TEST(EventListHeal, AFailureLeavesTheListDeafToItsEvents)
     util::StringUtil::setConverter(nullptr);
 
     EXPECT_EQ(thrownBy([&] { list.heal(list, NoReference, HealMode::Normal); }), Result::NotAvailable);
-    events.front()->setClipName("changed");
-
     EXPECT_TRUE(listener.types.empty());
+    for (const Event& event : events)
+        event->setClipName("changed");
+
+    EXPECT_EQ(listener.types.size(), 2u);
     list.removeListener(&listener);
 }
 

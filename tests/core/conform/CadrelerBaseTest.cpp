@@ -524,10 +524,13 @@ TEST(CadrelerBase, FinishesTheDetectAlgorithmsThatDoNotLookWhetherTheUserCancels
 TEST(CadrelerBase, EndsARunWithTheCodeThatADetectAlgorithmThrows)
 {
     SwappedFilm film;
-    film.model.settings().setCreateInsertMarkers(true);
-    film.model.newEdl().add(makeEvent("NEW", "00:00:00:00", "00:00:10:00", "00:00:10:00", "00:00:00:00"));
+    film.model.settings().setCreateDissolveWipeMarkers(true);
+    const auto dissolve = makeEvent("NEW", "00:00:00:00", "00:00:10:00", "10:00:00:00", "10:00:10:00");
+    dissolve->setTransitionType(core::TransitionType::Dissolve);
+    dissolve->setTransitionDuration(-1);
+    film.model.newEdl().add(dissolve);
 
-    EXPECT_EQ(film.engineWithSteps.run(film.model.changeEdl()), Result::InvalidArgument);
+    EXPECT_EQ(film.engineWithSteps.run(film.model.changeEdl()), Result::OutOfRange);
 
     EXPECT_EQ(film.engineWithSteps.calls, stepsUpTo("run state"));
 }

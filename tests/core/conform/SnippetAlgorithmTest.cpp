@@ -278,29 +278,53 @@ TEST(SnippetAlgorithm, PieceMayPassTheThresholdByATinyPartOfAFrame)
 
 TEST(SnippetAlgorithm, PieceThatPassesTheThresholdByTheWholeToleranceDoesNotCount)
 {
-    // At one frame a second, from a clip at 0, the frames of a piece are the very float that its length is.
+    // At two frames a second, from a clip at 0, the frames of a piece are the very float that twice its length is.
     const auto startAfter = [](double piece) {
-        SnippetFilm film(Framerate(1, 0));
-        film.settings().setSnippetThreshold(0);
+        SnippetFilm film(Framerate(2, 0));
+        film.settings().setSnippetThreshold(1);
         addClip(film.dialogue, 0.0, 100.0);
         film.addCut({cutEvent(film.dialogue, {piece, 200.0}, {1000.0 + piece, 1200.0})});
         film.process();
         return film.cuts.cutAt(0)->cutEvents()[0]->srcIn();
     };
 
-    EXPECT_EQ(startAfter(SameInstant), SameInstant);
-    EXPECT_EQ(startAfter(std::nextafter(SameInstant, 0.0)), 0.0);
+    const double within = (1.0 + SameInstant * 0.999) / 2.0;
+    const double beyond = (1.0 + SameInstant * 1.001) / 2.0;
+    EXPECT_EQ(startAfter(within), 0.0);
+    EXPECT_EQ(startAfter(beyond), beyond);
 }
 
-TEST(SnippetAlgorithm, PieceOfAnyLengthAboveZeroIsLeftOver)
+TEST(SnippetAlgorithm, LessThanAnInstantIsNothingAndAnInstantIsLeftOver)
 {
-    SnippetFilm film;
-    film.clip(1000 - 1e-5, 1100);
-    film.carry(range(1000, 2000, 5000));
+    // At one frame a second and from 0, so that nothing is rounded. At the start the range begins so far into a clip; at
+    // the end the clip begins so far before the end of the range.
+    const auto movedBy = [](double piece) {
+        SnippetFilm film(Framerate(1, 0));
+        addClip(film.dialogue, 0.0, 100.0);
+        film.addCut({cutEvent(film.dialogue, {piece, 50.0}, {1000.0, 1050.0 - piece})});
+        film.process();
+        return piece - film.cuts.cutAt(0)->cutEvents()[0]->srcIn();
+    };
+
+    EXPECT_EQ(movedBy(std::nextafter(SameInstant, 0.0)), 0.0);
+    EXPECT_EQ(movedBy(SameInstant), SameInstant);
+    EXPECT_EQ(movedBy(1.6e-14), 0.0);
+}
+
+TEST(SnippetAlgorithm, RoundingOfAClipsEndLetsNoFollowerGiveWay)
+{
+    // 1.6e-14 s of a clip stand behind the end of the range, and a range of another speed follows.
+    SnippetFilm film(Framerate(1, 0));
+    addClip(film.dialogue, 0.0, 10.0 + 1.6e-14);
+    film.addCut({cutEvent(film.dialogue, {0.0, 10.0}, {0.0, 10.0})});
+    film.addCut({cutEvent(film.dialogue, {50.0, 60.0}, {10.0, 20.0})});
 
     film.process();
 
-    EXPECT_EQ(film.cuts.cutAt(0)->cutEvents()[0]->srcIn(), film.seconds(1000 - 1e-5));
+    EXPECT_EQ(film.cuts.cutAt(0)->cutEvents()[0]->srcOut(), 10.0);
+    EXPECT_EQ(film.cuts.cutAt(0)->cutEvents()[0]->dstOut(), 10.0);
+    EXPECT_EQ(film.cuts.cutAt(1)->cutEvents()[0]->srcIn(), 50.0);
+    EXPECT_EQ(film.cuts.cutAt(1)->cutEvents()[0]->dstIn(), 10.0);
 }
 
 TEST(SnippetAlgorithm, RangeThatMeetsAClipExactlyHasNothingLeftOver)

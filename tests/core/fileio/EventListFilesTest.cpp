@@ -69,6 +69,19 @@ TEST(EventListFiles, LoadsInPlaceOfThePresentEvents)
     EXPECT_EQ(rollsOf(events), Names{"NEW"});
 }
 
+TEST(EventListFiles, LoadingWithoutAFramerateProviderIsNotAvailableAndChangesNothing)
+{
+    const TempFolder folder;
+    const auto path = folder.write("reel.edl", edlOf({"NEW"}));
+    EventList events;
+    events.add(std::make_shared<EventBase>());
+
+    EXPECT_EQ(thrownBy([&] { events.load(widePath(path), false); }), Result::NotAvailable);
+    EXPECT_EQ(thrownBy([&] { events.load(widePath(path), true); }), Result::NotAvailable);
+
+    EXPECT_EQ(events.size(), 1U);
+}
+
 TEST(EventListFiles, LoadsBehindThePresentEvents)
 {
     const TempFolder folder;

@@ -624,6 +624,52 @@ TEST_F(BehindAChange, ARangeShorterThanTheToleranceFails)
     EXPECT_EQ(thrownBy([&] { model.newEventsFor(event); }), Result::InvalidArgument);
 }
 
+TEST_F(BehindAChange, AnEventWithAnotherInsideItStandsThereOnce)
+{
+    //  old, new   |------------- outer -------------|
+    //                    |--- inner ---|
+    const auto outer = makeEvent("O", "08:00:00:00", "08:00:30:00", "01:00:00:00", "01:00:30:00");
+    const auto inner = makeEvent("I", "08:00:00:00", "08:00:10:00", "01:00:10:00", "01:00:20:00");
+    for (core::EventList* list : {&model.oldEdl(), &model.newEdl()}) {
+        list->add(outer);
+        list->add(inner);
+    }
+    const auto event = change("00:59:50:00", "01:00:40:00", "00:59:50:00", "01:00:40:00");
+
+    EXPECT_EQ(model.oldEventsFor(event).events(), (Events{outer, inner}));
+    EXPECT_EQ(model.newEventsFor(event).events(), (Events{outer, inner}));
+}
+
+TEST_F(BehindAChange, AnEventThatIsInTheProgrammeTwiceStandsThereOnce)
+{
+    model.oldEdl().add(b);
+    const auto event = change("00:00:15:00", "00:00:35:00", "00:01:50:00", "00:02:00:00");
+
+    EXPECT_EQ(model.oldEventsFor(event).events(), (Events{a, b, c}));
+}
+
+TEST_F(BehindAChange, ManyChangesAreAnsweredAtOneGoAListForEach)
+{
+    const auto first = change("00:00:15:00", "00:00:25:00", "00:01:50:00", "00:02:00:00");
+    const auto empty = change("00:00:15:00", "00:00:15:00", "00:01:50:00", "00:02:00:00");
+    const auto last = change("00:00:30:00", "00:00:40:00", "00:02:10:00", "00:02:20:00");
+    const Events asked{last, first, b, empty, nullptr, last};
+
+    const std::vector<EventList> oldEvents = model.oldEventsFor(asked);
+    const std::vector<EventList> newEvents = model.newEventsFor(asked);
+
+    const std::vector<Events> expectedOld{{c}, {a, b}, {}, {}, {}, {c}};
+    const std::vector<Events> expectedNew{{z}, {x, y}, {}, {}, {}, {z}};
+    ASSERT_EQ(oldEvents.size(), expectedOld.size());
+    ASSERT_EQ(newEvents.size(), expectedNew.size());
+    for (std::size_t index = 0; index < asked.size(); ++index) {
+        EXPECT_EQ(oldEvents[index].events(), expectedOld[index]) << index;
+        EXPECT_EQ(newEvents[index].events(), expectedNew[index]) << index;
+        EXPECT_EQ(oldEvents[index].listKind(), 2) << index;
+    }
+    EXPECT_TRUE(model.oldEventsFor(Events{}).empty());
+}
+
 TEST_F(BehindAChange, AskingIsNoChange)
 {
     const auto event = change("00:00:15:00", "00:00:25:00", "00:01:50:00", "00:02:00:00");

@@ -372,6 +372,27 @@ TEST_P(ProjectTimesTest, TheProjectEndStaysWithoutPreview)
     EXPECT_EQ(host.adapter.projectEnd(), host.origin);
 }
 
+TEST_P(ProjectTimesTest, TheProjectEndGoesBackWhenThePreviewIsOver)
+{
+    requireOk(host.document()->setProjectEnd(5000.0 - host.origin));
+    host.adapter.model().setPreviewActive(true);
+    host.adapter.computePreviewOffset();
+    host.adapter.extendProjectEnd(false);
+    ASSERT_GT(host.adapter.projectEnd(), Day);
+    addClip(4000.0, Day + 10.0);
+    host.adapter.extendProjectEnd(false);
+    ASSERT_EQ(host.adapter.projectEnd(), 3.0 * Day);
+    host.edit(u"Delete", [&] { host.transaction()->deleteRange(host.document(), 0, 0.0, 2.0 * Day); });
+
+    host.adapter.model().setPreviewActive(false);
+    host.adapter.extendProjectEnd(false);
+
+    EXPECT_EQ(host.adapter.projectEnd(), 5000.0);
+    requireOk(host.document()->setProjectEnd(6000.0 - host.origin));
+    host.adapter.extendProjectEnd(false);
+    EXPECT_EQ(host.adapter.projectEnd(), 6000.0) << "It goes back once.";
+}
+
 TEST_P(ProjectTimesTest, TheProjectEndCannotBeExtendedWithoutAnOffset)
 {
     const auto document = makeCounted<AlteredDocument>(host.document());

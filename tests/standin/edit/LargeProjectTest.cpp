@@ -169,4 +169,45 @@ TEST(LargeProject, WhatLiesOutsideOfARangeDoesNotCount)
     EXPECT_LT(many, 8.0 * few);
 }
 
+TEST(LargeProject, NoEditIsQuadraticInWhatIsStackedOnOneTrack)
+{
+    constexpr double Length = 1000.0;
+    enum class Stack { Clips, Ranges, Points };
+    const auto secondsToConform = [](Stack stack, int count) {
+        TestHost host;
+        const auto track = host.addTrack(stack == Stack::Clips ? TypeWord::Audio : TypeWord::Marker, u"track");
+        const auto list = create<IObjectList>(host.context());
+        list->add(track.get(), 0);
+        host.edit(u"Fill", [&] {
+            for (int index = 0; index < count; ++index) {
+                const double start = Length * index / count / 2;
+                if (stack == Stack::Clips)
+                    host.addClip(track, u"clip", start, start + Length / 2);
+                else if (stack == Stack::Ranges)
+                    host.addRangeMarker(track, u"range", 0.0, Length);
+                else
+                    host.addPointMarker(track, u"point", Length / 2);
+            }
+        });
+        return secondsOf([&] {
+            host.edit(u"Conform", [&] {
+                for (int part = 0; part < 4; ++part)
+                    host.editService()->copyRange(host.document(), list.get(), 0, part * Length / 4,
+                                                  (part + 1) * Length / 4, 2 * Length + (part ^ 1) * Length / 4);
+                host.transaction()->deleteRange(host.document(), 0, 0.0, Length);
+                host.editService()->closeRange(host.document(), list.get(), 0.0, 4.0 * Length, 0.0);
+            });
+            host.undo();
+            host.redo();
+        });
+    };
+
+    for (const Stack stack : {Stack::Clips, Stack::Ranges, Stack::Points}) {
+        secondsToConform(stack, 500);
+        const double few = std::max(secondsToConform(stack, 2000), secondsToConform(stack, 2000));
+        const double many = std::min(secondsToConform(stack, 8000), secondsToConform(stack, 8000));
+        EXPECT_LT(many, 8.0 * few) << static_cast<int>(stack);
+    }
+}
+
 } // namespace standin::tests

@@ -347,16 +347,68 @@ TEST(AutomationInRanges, DeletingAllPointsOfACurveLeavesItsValuesOutside)
     EXPECT_EQ(film.volumeOf(film.track), "5=0.25 15=0.75");
 }
 
-TEST(AutomationInRanges, DeletingTheOnlyPointOfACurveLeavesOneWithItsValue)
+TEST(AutomationInRanges, DeletingLeavesTheOnlyPointOfACurveWhereItStands)
+{
+    constexpr double Day = 86400;
+    for (const double at : {0.0, 5.0, 10.0, 15.0 - Hair, 15.0}) {
+        Film film;
+        film.addVolume(film.track, {{at, 0.25f}});
+        const std::string before = film.dump();
+
+        film.deleteRange(5, 15);
+        film.deleteRange(0, Day);
+        film.deleteRange(5, 5 + 2 * Day);
+
+        EXPECT_EQ(film.dump(), before) << at;
+    }
+}
+
+TEST(AutomationInRanges, WritingTheValueOfACurveOverItsOnlyPointLeavesThePoint)
+{
+    Film film;
+    film.addVolume(film.track, {{50, 0.25f}});
+    const std::string before = film.dump();
+
+    film.copyRange({film.track}, 0, 20, 40);
+
+    EXPECT_EQ(film.dump(), before);
+}
+
+TEST(AutomationInRanges, DeletingAllOfACurveThatIsOneValueOutsideLeavesTheFirstPointThatHasIt)
+{
+    Film film;
+    film.addVolume(film.track, {{8, 0.5f}, {10, 0.25f}, {12, 0.75f}, {14, 0.25f}});
+
+    film.deleteRange(9, 15);
+    EXPECT_EQ(film.volumeOf(film.track), "8=0.5 9=0.375 15=0.25");
+    film.deleteRange(0, 100);
+
+    EXPECT_EQ(film.volumeOf(film.track), "15=0.25");
+}
+
+TEST(AutomationInRanges, WritingOverTheFirstPointOfAConstantCurveLeavesItWhereTheOtherMayBeFar)
+{
+    Film film;
+    film.addVolume(film.track, {{5, 0.25f}, {86405, 0.25f}});
+
+    film.copyRange({film.track}, 20, 40, 0);
+    EXPECT_EQ(film.volumeOf(film.track), "5=0.25 86405=0.25");
+    film.deleteRange(86400, 172800);
+
+    EXPECT_EQ(film.volumeOf(film.track), "5=0.25");
+}
+
+TEST(AutomationInRanges, ACurveThatHasBecomeConstantIsWrittenToAsBefore)
 {
     Film film;
     film.addVolume(film.track, {{10, 0.25f}});
+    film.deleteRange(0, 86400);
+    film.addPoint(film.track, Envelope::Curve::Volume, 20, 0.75f);
 
-    film.deleteRange(5, 15);
+    film.copyRange({film.track}, 15, 25, 40);
 
-    const auto points = childrenOf(*film.curveOf(film.track, Envelope::Curve::Volume));
-    ASSERT_EQ(points.size(), 1U);
-    EXPECT_EQ(query<IAutomationPoint>(points[0])->getValue(), 0.25f);
+    // Up from 0.25 at 10 to 0.75 at 20, and no further.
+    EXPECT_EQ(film.volumeOf(film.track), "10=0.25 20=0.75 40=0.75 40=0.5 45=0.75");
 }
 
 TEST(AutomationInRanges, DeletingFromTheStartOfTheProjectHoldsNothingBeforeIt)
