@@ -1,0 +1,194 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/keep/BlackCarrying.h"
+
+#include <algorithm>
+#include <iterator>
+#include <limits>
+#include <set>
+
+namespace cadrel::core {
+
+namespace {
+
+/// Before and after everything, far enough from the end of the numbers that a shift doesn't reach it.
+constexpr FrameRange AllTime{std::numeric_limits<std::int32_t>::min() / 2,
+                             std::numeric_limits<std::int32_t>::max() / 2};
+
+std::int32_t lengthOf(const FrameRanges& ranges)
+{
+    std::int32_t length = 0;
+    for (const FrameRange& range : ranges)
+        length += range.length();
+    return length;
+}
+
+/// The shifts of those frames of an island of old picture that survive nearest to its start and to its end.
+struct IslandEdges {
+    std::int32_t first = std::numeric_limits<std::int32_t>::max();
+    std::int32_t last = std::numeric_limits<std::int32_t>::min();
+    std::vector<std::int32_t> shiftsAtFirst;
+    std::vector<std::int32_t> shiftsAtLast;
+
+    void add(const FrameRange& source, std::int32_t shift)
+    {
+        if (source.start < first)
+            shiftsAtFirst.clear();
+        if (source.start <= first)
+            shiftsAtFirst.push_back(shift);
+        first = std::min(first, source.start);
+        if (source.end > last)
+            shiftsAtLast.clear();
+        if (source.end >= last)
+            shiftsAtLast.push_back(shift);
+        last = std::max(last, source.end);
+    }
+};
+
+} // namespace
+
+BlackCarrying::BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLit, const Reels& reels,
+                             const FrameRanges& material, const Framerate& framerate, CarriedStretches& carried)
+    : m_oldLit(oldLit), m_newLit(newLit), m_reels(reels),
+      m_allMaterial(without(material, oldLit)), m_day{0, framerate.lastFrame}, m_partingGap(partingGap(framerate)),
+      m_carried(carried)
+{
+    m_material = within(m_day, m_allMaterial);
+}
+
+void BlackCarrying::run()
+{
+    carryWithinReels();
+    carryAroundReels();
+}
+
+FrameRanges BlackCarrying::lost() const
+{
+    std::vector<FrameRange> placed;
+    for (const CarriedStretch& stretch : m_placed)
+        placed.push_back(stretch.source());
+    return without(m_material, united(std::move(placed)));
+}
+
+void BlackCarrying::carryWithinReels()
+{
+    std::vector<IslandEdges> islands(m_oldLit.size());
+    for (const CarriedStretch& stretch : m_carried.stretches()) {
+        const FrameRange source = stretch.source();
+        const auto island = std::partition_point(m_oldLit.begin(), m_oldLit.end(),
+                                                 [&](const FrameRange& lit) { return lit.end <= source.start; });
+        islands[static_cast<std::size_t>(island - m_oldLit.begin())].add(source, stretch.shift);
+    }
+    for (std::size_t index = 0; index + 1 < m_oldLit.size(); ++index) {
+        const FrameRange gap{m_oldLit[index].end, m_oldLit[index + 1].start};
+        if (gap.length() < m_partingGap)
+            carryBetween(gap, islands[index].shiftsAtLast, islands[index + 1].shiftsAtFirst,
+                         islands[index].last == gap.start);
+    }
+}
+
+// The black between two shots goes where both have gone, if they have stayed together; else where more of it finds
+// room; where either has as much, after the left one unless its end is gone.
+void BlackCarrying::carryBetween(const FrameRange& gap, const std::vector<std::int32_t>& leftShifts,
+                                 const std::vector<std::int32_t>& rightShifts, bool isLeftWhole)
+{
+    const std::set<std::int32_t> right(rightShifts.begin(), rightShifts.end());
+    std::vector<std::int32_t> candidates;
+    std::copy_if(leftShifts.begin(), leftShifts.end(), std::back_inserter(candidates),
+                 [&right](std::int32_t shift) { return right.contains(shift); });
+    const auto& preferred = isLeftWhole ? leftShifts : rightShifts;
+    const auto& others = isLeftWhole ? rightShifts : leftShifts;
+    candidates.insert(candidates.end(), preferred.begin(), preferred.end());
+    candidates.insert(candidates.end(), others.begin(), others.end());
+    candidates.push_back(0);
+
+    std::int32_t best = 0;
+    std::int32_t mostRoom = 0;
+    for (const std::int32_t shift : candidates) {
+        const std::int32_t room = lengthOf(roomIn(gap.shiftedBy(shift)));
+        if (room > mostRoom) {
+            mostRoom = room;
+            best = shift;
+        }
+    }
+    carry(gap, best, AllTime);
+}
+
+void BlackCarrying::carryAroundReels()
+{
+    std::vector<FrameRange> staying;
+    for (const Surroundings& around : surroundings()) {
+        for (const FrameRange& block : joinedWithin(m_partingGap, within(around.oldFrames, m_allMaterial))) {
+            if (!carryAttached(around, block))
+                staying.push_back(block);
+        }
+    }
+    for (const FrameRange& block : staying)
+        carry(block, 0, AllTime);
+}
+
+std::vector<BlackCarrying::Surroundings> BlackCarrying::surroundings() const
+{
+    const FrameRanges oldGaps = without({AllTime}, m_reels.ofOld());
+    const FrameRanges newGaps = without({AllTime}, m_reels.ofNew());
+    std::vector<Surroundings> all;
+    for (std::size_t index = 0; index < oldGaps.size(); ++index) {
+        Surroundings around{oldGaps[index], AllTime, nullptr, nullptr};
+        if (m_reels.canBePaired()) {
+            around.newFrames = newGaps[index];
+            around.before = index > 0 ? &m_reels.pairs()[index - 1] : nullptr;
+            around.after = index < m_reels.pairs().size() ? &m_reels.pairs()[index] : nullptr;
+        }
+        all.push_back(around);
+    }
+    return all;
+}
+
+bool BlackCarrying::carryAttached(const Surroundings& around, const FrameRange& block)
+{
+    const FrameRange& gap = around.oldFrames;
+    const bool touchesEnd = around.before != nullptr && block.start - gap.start < m_partingGap;
+    const bool touchesStart = around.after != nullptr && gap.end - block.end < m_partingGap;
+    if (touchesEnd && touchesStart) {
+        const bool keepsLength = gap.length() == around.newFrames.length();
+        follow(keepsLength ? gap : FrameRange{gap.start, block.end}, around.before->endShift(), around.newFrames,
+               block);
+    } else if (touchesEnd) {
+        follow({gap.start, block.end}, around.before->endShift(), around.newFrames, block);
+    } else if (touchesStart) {
+        follow({block.start, gap.end}, around.after->startShift(), around.newFrames, block);
+    }
+    return touchesEnd || touchesStart;
+}
+
+void BlackCarrying::follow(const FrameRange& source, std::int32_t shift, const FrameRange& room,
+                           const FrameRange& block)
+{
+    if (shift != 0) {
+        const FrameRanges moving = within(source, within(block, m_allMaterial));
+        for (const FrameRange& range : without(moving, {m_day}))
+            m_outsideOfDay.push_back(range);
+        const FrameRange destinationDay = m_day.shiftedBy(-shift);
+        for (const FrameRange& range : without(within(m_day, moving), {destinationDay}))
+            m_outsideOfDay.push_back(range);
+    }
+    carry(source, shift, room);
+}
+
+void BlackCarrying::carry(const FrameRange& source, std::int32_t shift, const FrameRange& room)
+{
+    const FrameRange inDay = intersect(source, m_day);
+    const FrameRange destination = intersect(intersect(inDay.shiftedBy(shift), room), m_day);
+    for (const FrameRange& free : roomIn(destination)) {
+        const CarriedStretch stretch{free, shift, CarriedFrom::Black, CarriedStretch::NoEvent};
+        m_carried.carry(stretch);
+        m_placed.push_back(stretch);
+    }
+}
+
+FrameRanges BlackCarrying::roomIn(const FrameRange& destination) const
+{
+    return without(m_carried.freeIn(destination), within(destination, m_newLit));
+}
+
+} // namespace cadrel::core

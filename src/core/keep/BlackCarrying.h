@@ -1,0 +1,72 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/keep/CarriedStretches.h"
+#include "core/keep/FrameRange.h"
+#include "core/keep/Reels.h"
+#include "core/time/Framerate.h"
+
+#include <cstdint>
+#include <vector>
+
+namespace cadrel::core {
+
+/// Carries over what stands in the black of the old cut, after its picture. Each frame of black goes to one place at
+/// most, and never under a picture of the new cut.
+///
+/// Black within a reel goes along with the picture beside it. Around the reels it depends on what stands there: blocks
+/// are material less than 60 seconds apart.
+///
+///     reel |--| tail                              2-pop |--| reel
+///              follows the reel's end     follows the reel's start
+///                            |  |
+///                            stays
+class BlackCarrying {
+public:
+    /// `newLit` is where the new cut has a picture; `material` stands on tracks that the run changes. All are borrowed.
+    BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLit, const Reels& reels, const FrameRanges& material,
+                  const Framerate& framerate, CarriedStretches& carried);
+
+    void run();
+
+    /// The material in the black of the old cut, within the day.
+    const FrameRanges& material() const { return m_material; }
+    /// What of it has found no room.
+    FrameRanges lost() const;
+    /// Material that would have to move from or to a time that no timecode names.
+    const FrameRanges& outsideOfDay() const { return m_outsideOfDay; }
+
+private:
+    /// Black between two reels, or beside the first or the last.
+    struct Surroundings {
+        FrameRange oldFrames;
+        FrameRange newFrames;
+        const ReelPair* before;
+        const ReelPair* after;
+    };
+
+    void carryWithinReels();
+    void carryBetween(const FrameRange& gap, const std::vector<std::int32_t>& leftShifts,
+                      const std::vector<std::int32_t>& rightShifts, bool isLeftWhole);
+    void carryAroundReels();
+    std::vector<Surroundings> surroundings() const;
+    /// Whether the block goes along with a reel.
+    bool carryAttached(const Surroundings& around, const FrameRange& block);
+    void follow(const FrameRange& source, std::int32_t shift, const FrameRange& room, const FrameRange& block);
+    void carry(const FrameRange& source, std::int32_t shift, const FrameRange& room);
+    FrameRanges roomIn(const FrameRange& destination) const;
+
+    const FrameRanges& m_oldLit;
+    const FrameRanges& m_newLit;
+    const Reels& m_reels;
+    FrameRanges m_allMaterial; ///< in black, outside of the day too
+    FrameRanges m_material;
+    FrameRanges m_outsideOfDay;
+    FrameRange m_day;
+    std::int32_t m_partingGap;
+    CarriedStretches& m_carried;
+    std::vector<CarriedStretch> m_placed; ///< what has been carried out of black
+};
+
+} // namespace cadrel::core

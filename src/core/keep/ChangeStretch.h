@@ -1,0 +1,26 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/keep/FrameRange.h"
+#include "core/time/Framerate.h"
+
+#include <optional>
+
+namespace cadrel::core {
+
+class EventBase;
+
+/// What an event of a change EDL carries, in frames.
+struct ChangeStretch {
+    FrameRange destination;
+    std::int32_t shift = 0; ///< from the old place to the new one
+
+    FrameRange source() const { return destination.shiftedBy(-shift); }
+};
+
+/// Nothing for an event whose timecodes don't exist at the rate, or that carries nothing. Where both sides differ in
+/// length, the SRC decides.
+std::optional<ChangeStretch> changeStretchOf(const EventBase& event, const Framerate& framerate);
+
+} // namespace cadrel::core

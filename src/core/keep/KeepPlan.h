@@ -1,0 +1,59 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/keep/CarriedStretches.h"
+#include "core/keep/FrameRange.h"
+#include "core/time/SecondsRange.h"
+
+#include <cstdint>
+#include <optional>
+#include <vector>
+
+namespace cadrel::core {
+
+/// An event of the list that is carried out: neighbours that move alike, joined.
+struct KeptEvent {
+    FrameRange destination;
+    std::int32_t shift = 0;
+    std::vector<CarriedStretch> parts; ///< ascending, without gaps; all with the shift of the event
+
+    FrameRange source() const { return destination.shiftedBy(-shift); }
+    bool holds(CarriedFrom from) const;
+};
+
+/// Why a plan can't be carried out as it is.
+struct KeepRefusal {
+    enum Reason {
+        UnequalReels,    ///< the reels of the two cuts can't be paired; see `oldReels` and `newReels`
+        OutsideOfDay,    ///< `material` would have to move, and it stands, or came to stand, where no timecode is
+        MaterialInTheWay ///< `material` stands where grown picture goes
+    };
+
+    Reason reason = UnequalReels;
+    FrameRanges oldReels;
+    FrameRanges newReels;
+    FrameRanges material; ///< in frames of the old programme; may reach out of the day
+
+    /// How much of `material` there is, in frames.
+    std::int32_t amount() const;
+};
+
+/// What a run has to do.
+struct KeepPlan {
+    /// Set when nothing must be written before the user has decided. The rest tells what would be done all the same.
+    std::optional<KeepRefusal> refusal;
+    /// The list to carry out, ascending by destination. It can be empty although there is a hull: what stands there
+    /// goes then.
+    std::vector<KeptEvent> events;
+    /// What stays at its place outside of the hull, and so needs no event.
+    std::vector<KeptEvent> untouched;
+    /// The stretch that the run has to be restricted to. Nothing: there is nothing to do, and no run.
+    std::optional<FrameRange> hull;
+    /// The material in the old cut's black that goes, since it finds no room in the new one's; old programme.
+    FrameRanges lost;
+
+    bool needsRun() const { return hull.has_value(); }
+};
+
+} // namespace cadrel::core

@@ -1,0 +1,137 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/keep/PictureCarrying.h"
+
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/edl/HealedEvent.h"
+#include "core/keep/ChangeStretch.h"
+
+namespace cadrel::core {
+
+namespace {
+
+/// The events of a change EDL without healing.
+std::vector<ChangeStretch> unhealed(const EventList& changeEvents, const Framerate& framerate)
+{
+    std::vector<ChangeStretch> stretches;
+    std::vector<const EventList*> lists{&changeEvents};
+    while (!lists.empty()) {
+        const EventList& list = *lists.back();
+        lists.pop_back();
+        for (const auto& event : list.events()) {
+            if (const auto* healed = dynamic_cast<const HealedEvent*>(event.get()))
+                lists.push_back(&healed->healedEvents());
+            else if (const auto stretch = changeStretchOf(*event, framerate))
+                stretches.push_back(*stretch);
+        }
+    }
+    std::stable_sort(stretches.begin(), stretches.end(), [](const ChangeStretch& a, const ChangeStretch& b) {
+        return a.destination.start < b.destination.start;
+    });
+    return stretches;
+}
+
+} // namespace
+
+PictureCarrying::PictureCarrying(const PictureLine& oldLine, const PictureLine& newLine, const Reels& reels,
+                                 CarriedStretches& carried)
+    : m_new(newLine), m_reels(reels), m_comparison(oldLine, newLine), m_carried(carried)
+{
+}
+
+void PictureCarrying::run(const EventList& changeEvents, const Framerate& framerate)
+{
+    carryInPlace();
+    carryReelEnds();
+    carryChangeEvents(changeEvents, framerate);
+    carryHoles();
+}
+
+void PictureCarrying::carryInPlace()
+{
+    for (const FrameRange& reel : m_reels.ofNew())
+        carryEqual(0, reel, CarriedFrom::Unchanged);
+}
+
+// Material that stands twice can send a shot of the change EDL onto its twin. Where only one thing has changed, all
+// before it is as it was against the reel's start, and all after it against the reel's end.
+void PictureCarrying::carryReelEnds()
+{
+    for (const ReelPair& pair : m_reels.pairs()) {
+        const auto common = [&pair](std::int32_t shift) {
+            return intersect(pair.newFrames, pair.oldFrames.shiftedBy(shift));
+        };
+        const FrameRange fromStart = common(pair.startShift());
+        const FrameRanges afterHead = m_comparison.differencesUnder(pair.startShift(), fromStart);
+        const std::int32_t headEnd = afterHead.empty() ? fromStart.end : afterHead.front().start;
+        carryEqual(pair.startShift(), {fromStart.start, headEnd}, CarriedFrom::Cut);
+
+        const FrameRange upToEnd = common(pair.endShift());
+        const FrameRanges beforeTail = m_comparison.differencesUnder(pair.endShift(), upToEnd);
+        const std::int32_t tailStart = beforeTail.empty() ? upToEnd.start : beforeTail.back().end;
+        carryEqual(pair.endShift(), {tailStart, upToEnd.end}, CarriedFrom::Cut);
+    }
+}
+
+void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const Framerate& framerate)
+{
+    const std::vector<ChangeStretch> stretches = unhealed(changeEvents, framerate);
+    // Of several layers that claim one frame, that one is right under which the whole picture is the same.
+    for (const ChangeStretch& stretch : stretches)
+        carryEqual(stretch.shift, stretch.destination, CarriedFrom::Cut);
+    for (const ChangeStretch& stretch : stretches)
+        m_carried.carry(m_comparison.litUnder(stretch.shift, stretch.destination), stretch.shift, CarriedFrom::Cut);
+    // What was healed over a gap between two shots goes along, but not into black and not out of it.
+    for (const auto& event : changeEvents.events()) {
+        if (event->eventKind() != EventKind::Healed)
+            continue;
+        if (const auto stretch = changeStretchOf(*event, framerate))
+            m_carried.carry(m_comparison.litUnder(stretch->shift, stretch->destination), stretch->shift,
+                            CarriedFrom::Cut);
+    }
+}
+
+void PictureCarrying::carryHoles()
+{
+    for (const Hole& hole : findHoles()) {
+        if (hole.leftShift)
+            carryEqual(*hole.leftShift, hole.frames, CarriedFrom::Hole);
+        if (hole.rightShift)
+            carryEqual(*hole.rightShift, hole.frames, CarriedFrom::Hole);
+    }
+}
+
+void PictureCarrying::carryEqual(std::int32_t shift, const FrameRange& bounds, CarriedFrom from)
+{
+    m_carried.carry(m_comparison.equalUnder(shift, bounds), shift, from);
+}
+
+std::vector<PictureCarrying::Hole> PictureCarrying::findHoles() const
+{
+    std::vector<Hole> holes;
+    for (const FrameRange& reel : m_reels.ofNew()) {
+        const std::vector<Hole> found = holesOf(reel, m_reels.pairAtNew(reel.start));
+        holes.insert(holes.end(), found.begin(), found.end());
+    }
+    return holes;
+}
+
+std::vector<PictureCarrying::Hole> PictureCarrying::holesOf(const FrameRange& newReel, const ReelPair* pair) const
+{
+    std::vector<Hole> holes;
+    const auto orOf = [](std::optional<std::int32_t> shift, std::optional<std::int32_t> other) {
+        return shift ? shift : other;
+    };
+    const std::optional<std::int32_t> startShift = pair ? std::optional(pair->startShift()) : std::nullopt;
+    const std::optional<std::int32_t> endShift = pair ? std::optional(pair->endShift()) : std::nullopt;
+    for (const FrameRange& free : m_carried.freeIn(newReel)) {
+        const auto left = orOf(m_carried.shiftBefore(free.start, newReel), startShift);
+        const auto right = orOf(m_carried.shiftAfter(free.end, newReel), endShift);
+        for (const FrameRange& lit : within(free, m_new.lit()))
+            holes.push_back({lit, left, right});
+    }
+    return holes;
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,50 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/keep/CarriedStretches.h"
+#include "core/keep/PictureComparison.h"
+#include "core/keep/PictureLine.h"
+#include "core/keep/Reels.h"
+#include "core/time/Framerate.h"
+
+#include <optional>
+
+namespace cadrel::core {
+
+class EventBase;
+class EventList;
+
+/// Carries over what has a picture in both cuts: first what is equal at the same time, then what is equal from the start
+/// or up to the end of a reel, then what the change EDL tells, and last the holes between.
+class PictureCarrying {
+public:
+    PictureCarrying(const PictureLine& oldLine, const PictureLine& newLine, const Reels& reels,
+                    CarriedStretches& carried);
+
+    /// All steps. The change events that can't be used are passed over. Throws nothing of its own.
+    void run(const EventList& changeEvents, const Framerate& framerate);
+
+private:
+    /// What a hole can go on with.
+    struct Hole {
+        FrameRange frames;
+        std::optional<std::int32_t> leftShift;
+        std::optional<std::int32_t> rightShift;
+    };
+
+    void carryInPlace();
+    void carryReelEnds();
+    void carryChangeEvents(const EventList& changeEvents, const Framerate& framerate);
+    void carryHoles();
+    void carryEqual(std::int32_t shift, const FrameRange& bounds, CarriedFrom from);
+    std::vector<Hole> findHoles() const;
+    std::vector<Hole> holesOf(const FrameRange& newReel, const ReelPair* pair) const;
+
+    const PictureLine& m_new;
+    const Reels& m_reels;
+    PictureComparison m_comparison;
+    CarriedStretches& m_carried;
+};
+
+} // namespace cadrel::core
