@@ -686,6 +686,44 @@ TEST(Apply, WhatIsNotGivenIsAsInTheLastRun)
               "");
 }
 
+TEST(Apply, ASecondRunPutsItsMarkersInThePlaceOfThoseOfTheFirst)
+{
+    for (const Origin origin : Origins) {
+        const Scene scene(origin);
+        const Places once{
+            {"Event: 1 - A001 ", {"0-10"}}, {"Event: 2 - A002 ", {"10-18"}}, {"Event: 3 - A003 ", {"22-32"}}};
+        const Places inserts{{"Insert: B009", {"18-22"}}};
+        for (const Words& options : {Words{}, Words{"--tracks", "selected"}, Words{"--tracks", "all"}}) {
+            Words words{"--in-place"};
+            words.insert(words.end(), options.begin(), options.end());
+            ASSERT_EQ(scene.apply(words).status, 0);
+
+            EXPECT_EQ(placesOn("Destination", scene.project), once);
+            EXPECT_EQ(placesOn("Insert", scene.project), inserts);
+        }
+
+        ASSERT_EQ(scene.apply({"--in-place", "--no-destination-markers"}).status, 0);
+        EXPECT_EQ(placesOn("Destination", scene.project), Places());
+        EXPECT_EQ(placesOn("Insert", scene.project), inserts);
+    }
+}
+
+TEST(Apply, ASecondRunReplacesMarkersInAPreservedStretchAlone)
+{
+    const Scene scene;
+    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+
+    for (int time = 0; time < 2; ++time) {
+        ASSERT_EQ(scene.apply({"--in-place", "--preserve", "01:00:10:00", "01:00:20:00"}).status, 0);
+
+        EXPECT_EQ(
+            placesOn("Destination", scene.project),
+            (Places{{"Event: 1 - A001 ", {"0-10"}}, {"Event: 2 - A002 ", {"10-18"}}, {"Event: 3 - A003 ", {"22-32"}}}));
+        // The one that started in the stretch went whole, and of the new one the stretch takes its part.
+        EXPECT_EQ(placesOn("Insert", scene.project), (Places{{"Insert: B009", {"18-20"}}}));
+    }
+}
+
 TEST(Apply, ASecondRunTellsItsOwnMarkersAlone)
 {
     const Scene scene;

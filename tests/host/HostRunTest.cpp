@@ -186,6 +186,69 @@ TEST_P(HostRunTest, CanBeMadeAgain)
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel", u"Apply Cadrel"}));
 }
 
+//     film           0         10         20         30
+//     first run      |--- 2 ---|---- 1 ---|            markers of its own on "Destination"
+//     second run     |--- 2 ---|---- 1 ---|            and not a second time
+TEST_P(HostRunTest, PutsItsMarkersInThePlaceOfThoseOfAnEarlierRun)
+{
+    host.settings().setCreateDestinationMarkers(true);
+    const Texts once{"Event: 2 - A001  0-10", "Event: 1 - A001  10-20"};
+    host.conform();
+    const auto destinations = host.trackNamed(u"Destination");
+    const auto memos = host.trackNamed(u"Memos");
+    host.addPointMarker(memos, u"memo", host.inHost(5.0));
+    const std::string before = host.dump();
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(destinations), once);
+    EXPECT_EQ(host.contentOf(memos), Texts{"memo 15-15"});
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.dump(), before);
+
+    // What a preview holds locked is the system's own.
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    ASSERT_EQ(query<ITrackNode>(destinations)->getFlag(TrackFlag::Lock), ResultOk);
+    host.conform();
+    EXPECT_EQ(host.contentOf(destinations), once);
+    host.adapter().setPreviewActive(false);
+
+    host.settings().setCreateDestinationMarkers(false);
+    host.conform();
+    EXPECT_EQ(host.contentOf(destinations), Texts());
+}
+
+TEST_P(HostRunTest, LeavesTheMarkersOfAnEarlierRunOnATrackThatTheUserHasLocked)
+{
+    host.settings().setCreateDestinationMarkers(true);
+    host.conform();
+    const auto destinations = host.trackNamed(u"Destination");
+    const Texts once = host.contentOf(destinations);
+    query<ITrackNode>(destinations)->setFlag(TrackFlag::Lock, true);
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:20:00", "01:00:00:00", "01:00:20:00");
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(destinations), once);
+}
+
+TEST_P(HostRunTest, APreviewShowsItsOwnMarkersAlone)
+{
+    host.settings().setCreateDestinationMarkers(true);
+    host.conform();
+    const auto destinations = host.trackNamed(u"Destination");
+    ASSERT_EQ(host.contentOf(destinations).size(), 2U);
+
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(host.contentOf(destinations).size(), 4U);
+
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(destinations), (Texts{"Event: 2 - A001  0-10", "Event: 1 - A001  10-20"}));
+}
+
 TEST_P(HostRunTest, MakesTheTracksOfTheMarkersThatAreOn)
 {
     host.settings().setCreateDestinationMarkers(true);

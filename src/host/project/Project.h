@@ -139,9 +139,9 @@ public:
 
     /// Writes the source of the cut's events to their destination in the preview stretch.
     void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
-    /// The tracks are those that take part in a run, and the memos'.
+    /// The tracks are those whose material a run carries over, and the memos'.
     std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
-    /// Brings the preview stretch back over the real programme. A restricted run clears the preview too, also where its
+    /// Brings the preview stretch back over the real programme, from which the markers of an earlier run go. A restricted run clears the preview too, also where its
     /// range is empty and nothing is brought back.
     void completeApply(Velmark::IEditTransaction& transaction);
     /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws Result::InvalidArgument for an entry
@@ -198,6 +198,8 @@ private:
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
     bool isMarkerTrack(const Track& track) const;
+    /// A marker track on which runs alone write: any but the memos'.
+    bool isMarkerTrackOfRuns(const Track& track) const;
     /// By its role; an empty handle without one.
     Track newVideoTrack();
     /// Whether markers can be written there. On a track that the user has locked they would stay in the preview stretch.

@@ -145,8 +145,10 @@ std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBas
 
     core::Cut::CutEvents cutEvents;
     for (const Track& track : cadrelTracks()) {
-        // completeApply empties the memos' track, whatever is selected.
-        if (track.hostLocked() || !(isWanted(track) || track == markerTrack(TrackRole::Memos)))
+        // The markers of an earlier run aren't carried over: this run writes them anew. completeApply empties the memos'
+        // track, whatever is selected.
+        if (track.hostLocked() || isMarkerTrackOfRuns(track) ||
+            !(isWanted(track) || track == markerTrack(TrackRole::Memos)))
             continue;
         auto cutEvent = std::make_shared<CutEvent>(track, m_indexes);
         cutEvent->setSrcIn(srcIn);
@@ -265,7 +267,10 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
     const double offset = requiredOffset();
     m_indexes.clear();
     for (Track& track : tracks) {
-        track.removeRange(transaction, start, end);
+        if (isMarkerTrackOfRuns(track))
+            track.removeStartingIn(transaction, start, end);
+        else
+            track.removeRange(transaction, start, end);
         tick(1);
     }
     // What is before the stretch belongs to the real programme, and an edge there would leave automation points in it.

@@ -87,6 +87,11 @@ bool Project::isMarkerTrack(const Track& track) const
     return std::ranges::find(m_markerTracks, track) != m_markerTracks.end();
 }
 
+bool Project::isMarkerTrackOfRuns(const Track& track) const
+{
+    return isMarkerTrack(track) && !(track == m_markerTracks.back());
+}
+
 Track Project::newVideoTrack()
 {
     Track video;

@@ -330,19 +330,17 @@ void Track::removeEvent(IEditTransaction& transaction, HostEvent& event)
 
 void Track::removeRange(IEditTransaction& transaction, double start, double end)
 {
-    const auto node = requiredNode();
-    if (start > end)
-        throw Result::InvalidArgument;
-    const double from = start - timeOrigin();
+    std::vector<Counted<IProjectNode>> children = childrenStartingIn(start, end);
     const double to = end - timeOrigin();
-    const auto times = container();
-    std::vector<Counted<IProjectNode>> children = childrenOf(*node);
-    std::erase_if(children, [&](const Counted<IProjectNode>& child) {
-        const core::SecondsRange span = orderedSpanOf(*child, times.get());
-        const bool liesInRange = !isBefore(span.start, from) && isBefore(span.start, to) && !isBefore(to, span.end);
-        return !liesInRange;
+    std::erase_if(children, [to, times = container()](const Counted<IProjectNode>& child) {
+        return isBefore(to, orderedSpanOf(*child, times.get()).end);
     });
     removeChildren(transaction, children);
+}
+
+void Track::removeStartingIn(IEditTransaction& transaction, double start, double end)
+{
+    removeChildren(transaction, childrenStartingIn(start, end));
 }
 
 TrackIndex Track::readIndex() const
@@ -429,6 +427,21 @@ std::int64_t Track::highestUserId() const
     for (const HostEvent& event : clipEvents())
         highest = std::max(highest, event.getUserId());
     return highest;
+}
+
+std::vector<Counted<IProjectNode>> Track::childrenStartingIn(double start, double end) const
+{
+    const auto node = requiredNode();
+    if (start > end)
+        throw Result::InvalidArgument;
+    const double from = start - timeOrigin();
+    const double to = end - timeOrigin();
+    std::vector<Counted<IProjectNode>> children = childrenOf(*node);
+    std::erase_if(children, [from, to, times = container()](const Counted<IProjectNode>& child) {
+        const core::SecondsRange span = orderedSpanOf(*child, times.get());
+        return isBefore(span.start, from) || !isBefore(span.start, to);
+    });
+    return children;
 }
 
 void Track::removeChildren(IEditTransaction& transaction, const std::vector<Counted<IProjectNode>>& children)

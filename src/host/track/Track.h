@@ -100,6 +100,8 @@ public:
     /// Removes the events that lie in the range whole, in seconds of the project's clock. A point at the start lies in
     /// it, a point at the end doesn't.
     void removeRange(Velmark::IEditTransaction& transaction, double start, double end);
+    /// Removes the events that start in the range, also those that end after it; else as removeRange.
+    void removeStartingIn(Velmark::IEditTransaction& transaction, double start, double end);
 
     /// What stands on the track now. Throws Result::HostObjectMissing without a track.
     TrackIndex readIndex() const;
@@ -126,6 +128,9 @@ private:
     std::optional<std::int64_t> integerAttribute(const char* key) const;
     /// 0 when none has an id.
     std::int64_t highestUserId() const;
+    /// The children that start in a range, in seconds of the project's clock. Throws Result::InvalidArgument for a
+    /// reversed one.
+    std::vector<Velmark::Counted<Velmark::IProjectNode>> childrenStartingIn(double start, double end) const;
     void removeChildren(Velmark::IEditTransaction& transaction,
                         const std::vector<Velmark::Counted<Velmark::IProjectNode>>& children);
     void noteChange();

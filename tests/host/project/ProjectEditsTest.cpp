@@ -245,6 +245,17 @@ TEST_P(ProjectEditsTest, ACutOfSelectedTracksTakesTheMemosAlong)
     EXPECT_EQ(tracksOf(*host.adapter.makeCut(tenSeconds())), std::vector<std::wstring>{L"Music"});
 }
 
+TEST_P(ProjectEditsTest, ACutLeavesOutTheMarkersOfRuns)
+{
+    addTrack(u"FX");
+    createMarkerTracks();
+    host.addTrack(TypeWord::Marker, u"Cues");
+
+    const std::vector<std::wstring> tracks = tracksOf(*host.adapter.makeCut(tenSeconds()));
+
+    EXPECT_EQ(tracks, (std::vector<std::wstring>{L"FX", L"Memos", L"Cues"}));
+}
+
 TEST_P(ProjectEditsTest, TheEventsOfACutSeeWhatStandsOnTheirTracks)
 {
     const auto fx = addTrack(u"FX");
@@ -555,6 +566,29 @@ TEST_P(ProjectEditsTest, ARestrictedRunReplacesItsRangeAlone)
     EXPECT_EQ(complete(), Result::Ok);
 
     EXPECT_EQ(contentOf(fx), (Content{"before 0-9", "across 9-10", "new 10-20", "behind 20-30"}));
+}
+
+//     range                      10|=============|20
+//     markers of runs    |--a--|--b--|--c--|  |--d--|--e--|     c and d go, b ends where the range begins
+TEST_P(ProjectEditsTest, ARestrictedRunRemovesTheMarkersOfRunsThatStartInItsRange)
+{
+    createMarkerTracks();
+    for (const char16_t* const name : {u"Destination", u"Memos"}) {
+        const auto track = markerTrack(name);
+        host.addRangeMarker(track, u"a", film(0.0), film(8.0));
+        host.addRangeMarker(track, u"b", film(8.0), film(12.0));
+        host.addRangeMarker(track, u"c", film(10.0), film(15.0));
+        host.addRangeMarker(track, u"d", film(18.0), film(22.0));
+        host.addRangeMarker(track, u"e", film(20.0), film(25.0));
+        host.addRangeMarker(track, u"new", film(Day + 16.0), film(Day + 20.0));
+    }
+    settings().setRestrictRange(true);
+    settings().setPreserveMaterial(3610.0, 3620.0);
+
+    EXPECT_EQ(complete(), Result::Ok);
+
+    EXPECT_EQ(contentOf(markerTrack(u"Destination")), (Content{"a 0-8", "b 8-10", "new 16-20", "e 20-25"}));
+    EXPECT_EQ(contentOf(markerTrack(u"Memos")), (Content{"a 0-8", "b 8-10", "new 16-20", "e 20-25", "d 20-22"}));
 }
 
 TEST_P(ProjectEditsTest, ARestrictedRunMayBeginBeforeTheClock)
