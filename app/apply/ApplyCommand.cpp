@@ -202,13 +202,29 @@ ApplyFacts factsOf(HostedProject& hosted, const ChangeSource& source, const Appl
     return facts;
 }
 
+/// Takes the markers of earlier runs out that a run has replaced by its own, so that those count as new where they are the
+/// same.
+void forgetReplacedMarkers(ProjectState& state, const Settings& settings, double origin)
+{
+    const auto isReplaced = [&](const Placement& marker) {
+        const double start = marker.start + origin;
+        return !settings.restrictRange() || (start - settings.preserveMaterialBefore() > -standin::SameInstant &&
+                                             settings.preserveMaterialAfter() - start >= standin::SameInstant);
+    };
+    for (auto& [track, placements] : state) {
+        if (isMarkedByRuns(*track) && !track->isLocked())
+            std::erase_if(placements, isReplaced);
+    }
+}
+
 /// Runs, and adds what that did to the project.
 void apply(HostedProject& hosted, ApplyFacts& facts)
 {
-    const ProjectState before = stateOf(hosted.project());
+    ProjectState before = stateOf(hosted.project());
     const auto start = std::chrono::steady_clock::now();
     hosted.apply();
     facts.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    forgetReplacedMarkers(before, hosted.model().settings(), facts.timeOrigin);
     facts.tracks = compare(before, hosted.project(), shiftOf(hosted.model(), facts.timeOrigin));
 }
 

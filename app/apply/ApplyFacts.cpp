@@ -14,9 +14,6 @@ namespace cadrel::app {
 using host::TrackRole;
 using standin::Track;
 
-namespace {
-
-/// Whether runs write markers on the track: true for all of Cadrel's marker tracks except the one for the user's memos.
 bool isMarkedByRuns(const Track& track)
 {
     const auto attribute = track.attributes().find(Velmark::AttributeKey::MarkerType);
@@ -25,8 +22,6 @@ bool isMarkedByRuns(const Track& track)
     const auto* role = std::get_if<Velmark::int64>(&attribute->second.value);
     return role && *role >= TrackRole::Destination && *role <= TrackRole::Overlap;
 }
-
-} // namespace
 
 std::vector<const TrackComparison*> ApplyFacts::userTracks() const
 {

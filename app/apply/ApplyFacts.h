@@ -17,6 +17,9 @@ class EventBase;
 
 namespace cadrel::app {
 
+/// Whether runs write markers on the track: true for all of Cadrel's marker tracks except the one for the user's memos.
+bool isMarkedByRuns(const standin::Track& track);
+
 /// A change event that a run leaves out, and why.
 struct PassedOver {
     const core::EventBase* event;
