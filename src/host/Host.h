@@ -125,7 +125,8 @@ public:
     util::Result::Type generateMarkers(const std::vector<core::MarkerEntry>& entries) override;
     core::CadrelRunState getRunState() override;
     core::CadrelPreviewState getPreviewState() override;
-    /// Applies the cuts and then, where the settings ask for it, leads the automation over the stretches between them.
+    /// Applies the cuts and then holds the automation over the stretches between them or, where the settings ask for it,
+    /// leads it straight over them.
     util::Result::Type applyVirginTerritories(core::CutList& cuts) override;
     /// Says which events the preview stretch shows, so that edited memos follow; it writes nothing.
     util::Result::Type setProjectEvents(const core::EventList& events) override;

@@ -6,6 +6,7 @@
 #include "core/cut/CutList.h"
 #include "core/cut/ProgressHandlerBase.h"
 #include "core/model/DataModel.h"
+#include "core/notify/ChangeContext.h"
 #include "host/Host.h"
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
@@ -151,7 +152,11 @@ core::CadrelPreviewState Host::getPreviewState()
 Result::Type Host::applyVirginTerritories(core::CutList& cuts)
 {
     const Result::Type result = CadrelerBase::applyVirginTerritories(cuts);
-    if (result != Result::Ok || !m_currentProject || !m_currentProject->model().settings().createVirginTerritories())
+    if (result != Result::Ok || !m_currentProject)
+        return result;
+    // A preview is cleared again, and what it would leave at its end would stay.
+    m_currentProject->holdAutomation(openTransaction(), cuts, m_served == core::ActionChangeContext::Run);
+    if (!m_currentProject->model().settings().createVirginTerritories())
         return result;
     announce(L"Virgin Territories");
     m_currentProject->markVirginTerritories(openTransaction(), cuts);

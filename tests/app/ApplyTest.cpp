@@ -620,6 +620,69 @@ TEST(Apply, VirginTerritoriesLeadTheAutomationOverWhatHasNoOldSound)
     }
 }
 
+/// The value of a curve of `show` at a time in seconds behind 01:00:00:00, at which no point stands.
+double valueAt(const json& curve, double time)
+{
+    double leftTime = 0.0;
+    double leftValue = -1.0;
+    for (const json& point : curve.at("points")) {
+        const double pointTime = secondsOf(point);
+        const auto value = point.at("value").get<double>();
+        if (pointTime > time)
+            return leftValue < 0.0 ? value
+                                   : leftValue + (value - leftValue) * (time - leftTime) / (pointTime - leftTime);
+        leftTime = pointTime;
+        leftValue = value;
+    }
+    return leftValue;
+}
+
+//     old cut   0.5 --------------------18\19 0.25 --------------28\30 0.0      the volume, with a fade-out at the end
+//               0--- ONE ---10----- TWO ----20----- THREE ----30
+TEST(Apply, AFadeAtTheEndOfTheReelIsHeardInNoInsert)
+{
+    const TempFolder folder;
+    const auto project = folder.write("fade.stage", projectWith(R"({"kind": "audio", "name": "DIA", "curves": [
+        {"number": 1, "automates": "volume", "points": [
+          {"time": 3600, "value": 0.5}, {"time": 3618, "value": 0.5}, {"time": 3619, "value": 0.25},
+          {"time": 3628, "value": 0.25}, {"time": 3630, "value": 0}]}]})"));
+    const auto result = folder / "result.stage";
+    const auto oldFile = folder.write("old.edl", oldCut());
+    const auto applied = [&](const std::string& newFile) {
+        const Outcome outcome =
+            runCadrel({"apply", project, "--old", oldFile, "--new", newFile, "-o", result, "--json", "-"});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return json::parse(outcome.out);
+    };
+    const auto expectValues = [&](const std::vector<std::pair<double, double>>& values) {
+        const json curve = named(show(result).at("tracks"), "DIA").at("automation").at(0);
+        for (const auto& [time, value] : values)
+            EXPECT_NEAR(valueAt(curve, time), value, 1e-6) << time;
+    };
+
+    // The insert stands at 18 to 22, and the fade at 30 to 32.
+    EXPECT_EQ(markersOf(applied(folder.write("new.edl", newCut())), "Automation Warning"), Words());
+    expectValues({{-1000.0, 0.5},
+                  {5.0, 0.5},
+                  {15.0, 0.5},
+                  {17.5, 0.25},
+                  {18.5, 0.25},
+                  {21.5, 0.25},
+                  {31.0, 0.125},
+                  {33.0, 0.0}});
+
+    // ONE begins four seconds later, and an insert takes the place of TWO.
+    const json report = applied(folder.write(
+        "later.edl", "TITLE: LATER\n" + cut("001", "B009", "05:00:00:00 05:00:04:00", "01:00:00:00 01:00:04:00") +
+                         clipName("NEW") + cut("002", "A001", "10:00:00:00 10:00:10:00", "01:00:04:00 01:00:14:00") +
+                         clipName("ONE") + cut("003", "B010", "06:00:00:00 06:00:06:00", "01:00:14:00 01:00:20:00") +
+                         clipName("NEWER") + cut("004", "A003", "12:00:00:00 12:00:10:00", "01:00:20:00 01:00:30:00") +
+                         clipName("THREE")));
+    expectValues(
+        {{-1000.0, 0.5}, {2.0, 0.5}, {9.0, 0.5}, {14.5, 0.5}, {19.5, 0.5}, {20.5, 0.25}, {29.0, 0.125}, {31.0, 0.0}});
+    EXPECT_EQ(markersOf(report, "Automation Warning"), Words{"20-20 Automation warning in DIA "});
+}
+
 TEST(Apply, OutsideOfAPreservedStretchNothingChanges)
 {
     for (const Origin origin : Origins) {
@@ -734,6 +797,10 @@ TEST(Apply, ASecondRunTellsItsOwnMarkersAlone)
     EXPECT_EQ(markersOf(report, "Destination"),
               (Words{"0-10 Event: 1 - A001 ", "10-18 Event: 2 - A002 ", "22-32 Event: 3 - A003 "}));
     EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
+
+    const json ofStretch = scene.applyAsJson({"--preserve", "01:00:10:00", "01:00:20:00"});
+    EXPECT_EQ(markersOf(ofStretch, "Destination"), Words{"10-18 Event: 2 - A002 "});
+    EXPECT_EQ(markersOf(ofStretch, "Insert"), Words{"18-20 Insert: B009"});
 }
 
 TEST(Apply, EventsOfTheNewCutThatStandNowhereDoNotStopARun)

@@ -433,6 +433,64 @@ TEST_P(HostRunTest, LetsTheAutomationRunStraightOverWhatNothingCovers)
         EXPECT_NEAR(curve.valueBehind(host.inHost(time)).value_or(-1.0), onLine(time), 1e-6) << time;
 }
 
+//     old film    0.5 -------10------15 0.25 -------28\30 0.0         a fade-out at its end
+//     new film    5-- 0.5 --15  ..gap..  20-- 0.25 --28 ..gap.. 40-- the fade --42
+TEST_P(HostRunTest, HoldsTheAutomationOverWhatNothingCovers)
+{
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:28:00", "01:00:30:00", "01:00:40:00", "01:00:42:00");
+    host.carryOver("01:00:00:00", "01:00:10:00", "01:00:05:00", "01:00:15:00");
+    host.carryOver("01:00:20:00", "01:00:28:00", "01:00:20:00", "01:00:28:00");
+    for (const auto& [time, value] : {std::pair(2.0, 0.75F), std::pair(8.0, 0.5F), std::pair(11.0, 0.5F),
+                                      std::pair(15.0, 0.25F), std::pair(28.0, 0.25F), std::pair(30.0, 0.0F)})
+        host.addPoint(track, volume, host.inHost(time), value);
+    const auto untouched = host.addTrack(TypeWord::Audio, u"Guide");
+    host.addPoint(untouched, volume, host.inHost(8.0), 0.5F);
+    host.addPoint(untouched, volume, host.inHost(9.0), 0.0F);
+    query<ITrackNode>(untouched)->setFlag(TrackFlag::Lock, true);
+    host.settings().setCreateAutomationWarningMarkers(true);
+    const std::string before = requestRun();
+
+    host.idle();
+
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(track, volume));
+    for (const auto& [time, value] :
+         {std::pair(-3000.0, 0.75), std::pair(4.9, 0.75), std::pair(6.0, 0.75), std::pair(10.0, 0.625),
+          std::pair(14.9, 0.5), std::pair(15.1, 0.5), std::pair(19.9, 0.5), std::pair(20.1, 0.25),
+          std::pair(28.1, 0.25), std::pair(39.9, 0.25), std::pair(41.0, 0.125), std::pair(42.1, 0.0),
+          std::pair(90000.0, 0.0)}) {
+        if (host.inHost(time) >= 0.0) {
+            EXPECT_NEAR(curve.valueBehind(host.inHost(time)).value_or(-1.0), value, 1e-6) << time;
+        }
+    }
+    EXPECT_EQ(standin::tests::childrenOf(*host.curveOf(untouched, volume)).size(), 2U);
+    EXPECT_EQ(host.contentOf(host.trackNamed(u"Automation Warning")), Texts{"Automation warning in DX  20-20"});
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.bytes(), before);
+}
+
+TEST_P(HostRunTest, AMuteAtTheEndOfTheReelDoesNotReachBackIntoAnInsertOfAPreview)
+{
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00");
+    host.carryOver("01:00:05:00", "01:00:10:00", "01:00:08:00", "01:00:13:00");
+    host.addPoint(track, volume, host.inHost(1.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(19.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(19.0), 0.0F);
+    host.adapter().setPreviewActive(true);
+
+    host.preview(host.model().changeEdl());
+
+    const double offset = host.adapter().getRunState().previewOffset;
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(track, volume));
+    for (const double time : {-1.0, 1.0, 5.5, 7.5, 9.0})
+        EXPECT_NEAR(curve.valueBehind(offset + host.inHost(time)).value_or(-1.0), 0.5, 1e-6) << time;
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(standin::tests::childrenOf(*host.curveOf(track, volume)).size(), 3U);
+}
+
 TEST_P(HostRunTest, KeepsTheAutomationThatALaterEventBringsBetweenTwo)
 {
     host.model().changeEdl().clear();

@@ -2,8 +2,11 @@
 
 #include "core/detect/AutomationWarningDetectAlgorithm.h"
 
+#include "core/cut/CadrelRunState.h"
 #include "core/cut/CutList.h"
 #include "core/edl/EventBase.h"
+#include "core/settings/Settings.h"
+#include "core/time/SecondsRange.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
@@ -70,10 +73,22 @@ bool meet(const EventBase& previous, const EventBase& current)
     return current.dstIn() >= previous.dstOut() && current.dstIn() - previous.dstOut() < Timecode(0, 0, 0, 1);
 }
 
+/// Where two ranges of a track meet.
+SecondsRange seamOf(const CutEventBase& p, const CutEventBase& q)
+{
+    return {std::min(p.dstOut(), q.dstIn()), std::max(p.dstOut(), q.dstIn())};
+}
+
+/// Over a gap a curve keeps its value, so that it jumps where the gap ends.
+SecondsRange endOfGap(const CutEventBase& /*p*/, const CutEventBase& q)
+{
+    return {q.dstIn(), q.dstIn()};
+}
+
 /// One marker for all tracks on which a curve jumps from one cut to the next; nothing if there is no such track.
-/// Reports a step for each track.
-template <typename Report>
-std::optional<MarkerEntry> warningBetween(const Cut& previous, const Cut& current, Report reportStep)
+/// `placeOf` gives the place of the jump on a track. Reports a step for each track.
+template <typename Place, typename Report>
+std::optional<MarkerEntry> warningBetween(const Cut& previous, const Cut& current, Place placeOf, Report reportStep)
 {
     std::optional<MarkerEntry> entry;
     const std::size_t trackCount = std::min(previous.cutEvents().size(), current.cutEvents().size());
@@ -83,12 +98,13 @@ std::optional<MarkerEntry> warningBetween(const Cut& previous, const Cut& curren
         const Automation before = p.update(p.srcOut()).automation;
         const Automation behind = q.update(q.srcIn()).automation;
         if (jumps(before, p.srcOut(), behind, q.srcIn())) {
+            const SecondsRange place = placeOf(p, q);
             if (!entry) {
-                entry = MarkerEntry{std::min(p.dstOut(), q.dstIn()), std::max(p.dstOut(), q.dstIn()),
-                                    util::StringUtil::toUtf8(L"Automation warning in "), MarkerKind::AutomationWarning};
+                entry = MarkerEntry{place.start, place.end, util::StringUtil::toUtf8(L"Automation warning in "),
+                                    MarkerKind::AutomationWarning};
             }
-            entry->start = std::min({entry->start, p.dstOut(), q.dstIn()});
-            entry->end = std::max({entry->end, p.dstOut(), q.dstIn()});
+            entry->start = std::min(entry->start, place.start);
+            entry->end = std::max(entry->end, place.end);
             entry->name += util::StringUtil::toUtf8(p.getTrackName()) + " ";
         }
         reportStep();
@@ -98,17 +114,25 @@ std::optional<MarkerEntry> warningBetween(const Cut& previous, const Cut& curren
 
 } // namespace
 
-std::vector<MarkerEntry> AutomationWarningDetectAlgorithm::detect(const CutList& cuts, const CadrelRunState& /*state*/,
+std::vector<MarkerEntry> AutomationWarningDetectAlgorithm::detect(const CutList& cuts, const CadrelRunState& state,
                                                                   ProgressHandlerBase* progress) const
 {
     const auto ordered = inTimeOrder(cuts);
     std::vector<MarkerEntry> entries;
+    const bool isLedOverGaps = state.settings && state.settings->createVirginTerritories();
+    const auto reportStep = [progress] { report(progress, 1); };
+    std::size_t latest = 0;
     for (std::size_t i = 1; i < ordered.size(); ++i) {
         const Cut& previous = *ordered[i - 1];
         const Cut& current = *ordered[i];
+        const Cut& last = *ordered[latest];
         std::optional<MarkerEntry> warning;
         if (meet(*previous.event(), *current.event()))
-            warning = warningBetween(previous, current, [progress] { report(progress, 1); });
+            warning = warningBetween(previous, current, seamOf, reportStep);
+        else if (!isLedOverGaps && current.event()->dstIn() > last.event()->dstOut())
+            warning = warningBetween(last, current, endOfGap, reportStep);
+        if (current.event()->dstOut() >= last.event()->dstOut())
+            latest = i;
         if (warning)
             entries.push_back(*warning);
         report(progress, warning ? 1 : current.cutEvents().size());

@@ -6,7 +6,8 @@
 
 namespace cadrel::core {
 
-/// Finds jumps of an automation curve where two ranges meet without a gap.
+/// Finds jumps of an automation curve from one range to the next: where the two meet and, unless the curve is led over
+/// gaps, at the end of a gap between them.
 class AutomationWarningDetectAlgorithm : public CadrelInformationAlgorithm {
 public:
     std::vector<MarkerEntry> detect(const CutList& cuts, const CadrelRunState& state,

@@ -147,6 +147,10 @@ public:
     /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws Result::InvalidArgument for an entry
     /// whose kind is none of MarkerKind; earlier ones stay written.
     void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
+    /// Lets each curve keep the value that it has come to where the cuts leave a gap, and have its first one before the first
+    /// cut. With `isWholeProgramme` it keeps the last one after the last cut too, to the end of what the run replaces. The
+    /// cuts are those that makeCut made, and their order doesn't matter.
+    void holdAutomation(Velmark::IEditTransaction& transaction, const core::CutList& cuts, bool isWholeProgramme);
     /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what
     /// another cut has written there. The cuts are those that makeCut made.
     void markVirginTerritories(Velmark::IEditTransaction& transaction, const core::CutList& cuts);
@@ -216,6 +220,8 @@ private:
     // Edits.
     /// Selected, where the settings ask for selected tracks alone.
     bool isWanted(const Track& track) const;
+    /// The tracks on which a run may write, whose automation it leads over what nothing covers.
+    std::vector<Track> automatedTracks();
     Velmark::Counted<Velmark::IObjectList> listOf(const std::vector<const Track*>& tracks) const;
     void copyRange(const std::vector<const Track*>& tracks, double start, double end, double destination);
     void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);

@@ -104,6 +104,24 @@ std::vector<SecondsRange> cover(std::vector<SecondsRange>& ranges, const Seconds
     return pieces;
 }
 
+using GapTracks = std::map<const ITrackNode*, GapTrack>;
+
+/// The tracks, with what the cuts have written on each.
+GapTracks gapTracksOf(const std::vector<Track>& tracks, const core::CutList& cuts)
+{
+    GapTracks found;
+    for (const Track& track : tracks)
+        found.emplace(track.node(), GapTrack{track.prepareVirginRange(), {}});
+    for (std::size_t i = 0; i < cuts.size(); ++i) {
+        for (const auto& cutEvent : cuts.cutAt(i)->cutEvents()) {
+            const auto ofTrack = found.find(hostEvent(cutEvent).track().node());
+            if (ofTrack != found.end() && isBefore(cutEvent->dstIn(), cutEvent->dstOut()))
+                cover(ofTrack->second.done, {cutEvent->dstIn(), cutEvent->dstOut()});
+        }
+    }
+    return found;
+}
+
 std::vector<const Track*> pointersTo(const std::vector<Track>& tracks)
 {
     std::vector<const Track*> pointers;
@@ -200,6 +218,36 @@ void Project::generateMarkers(IEditTransaction& transaction, const std::vector<c
     }
 }
 
+//     range     |                                              |
+//     cuts      |     |-- fade --|     |-- 1 --|-- 2 --|       |
+//     before     _____|``--..____|_____|```````|--..___|_______       what the curve has come to at the end of the reel
+//     after      `````|``--..____|_____|```````|--..___|_______
+void Project::holdAutomation(IEditTransaction& transaction, const core::CutList& cuts, bool isWholeProgramme)
+{
+    const double offset = requiredOffset();
+    m_indexes.clear();
+    double start = 0.0;
+    double end = 0.0;
+    getApplyRange(start, end);
+    for (auto& [node, track] : gapTracksOf(automatedTracks(), cuts)) {
+        const std::vector<SecondsRange>& written = track.done;
+        if (written.empty())
+            continue;
+        for (AutomationCurve& curve : track.curves) {
+            curve.holdBackwards(m_hostContext, transaction, std::max(start, 0.0) + offset,
+                                written.front().start + offset);
+            for (std::size_t i = 1; i < written.size(); ++i)
+                curve.hold(m_hostContext, transaction, written[i - 1].end + offset, written[i].start + offset);
+            if (!isWholeProgramme)
+                continue;
+            if (m_model.settings().restrictRange())
+                curve.hold(m_hostContext, transaction, written.back().end + offset, end + offset);
+            else
+                curve.holdLast(m_hostContext, transaction, written.back().end + offset, end + offset);
+        }
+    }
+}
+
 //     cuts       |---- i - 1 ----|        |---- i ----|
 //     curve    --+--.      .-----+--------+---.   .---+--
 //                    `----'                    `-'
@@ -209,18 +257,7 @@ void Project::markVirginTerritories(IEditTransaction& transaction, const core::C
 {
     const double offset = requiredOffset();
     m_indexes.clear();
-    std::map<const ITrackNode*, GapTrack> tracks;
-    for (const Track& track : cadrelTracks()) {
-        if (isWanted(track) && !track.hostLocked())
-            tracks.emplace(track.node(), GapTrack{track.prepareVirginRange(), {}});
-    }
-    for (std::size_t i = 0; i < cuts.size(); ++i) {
-        for (const auto& cutEvent : cuts.cutAt(i)->cutEvents()) {
-            const auto ofTrack = tracks.find(hostEvent(cutEvent).track().node());
-            if (ofTrack != tracks.end() && isBefore(cutEvent->dstIn(), cutEvent->dstOut()))
-                cover(ofTrack->second.done, {cutEvent->dstIn(), cutEvent->dstOut()});
-        }
-    }
+    GapTracks tracks = gapTracksOf(automatedTracks(), cuts);
     for (std::size_t i = 1; i < cuts.size(); ++i) {
         tick(tracks.size());
         const core::Cut& before = *cuts.cutAt(i - 1);
@@ -345,6 +382,13 @@ void Project::restoreProjectEnd()
 bool Project::isWanted(const Track& track) const
 {
     return m_model.settings().applyTo() != ApplyTo::SelectedTracks || track.isSelected();
+}
+
+std::vector<Track> Project::automatedTracks()
+{
+    std::vector<Track> tracks = cadrelTracks();
+    std::erase_if(tracks, [this](const Track& track) { return track.hostLocked() || !isWanted(track); });
+    return tracks;
 }
 
 Counted<IObjectList> Project::listOf(const std::vector<const Track*>& tracks) const

@@ -47,15 +47,69 @@ void AutomationCurve::fill(IHostContext* context, IEditTransaction& transaction,
 {
     if (end < start || m_points.empty())
         return;
-    const auto first = m_points.begin() + static_cast<std::ptrdiff_t>(firstAt(start));
-    const auto last = m_points.begin() + static_cast<std::ptrdiff_t>(firstAfter(end));
+    replace(context, transaction, firstAt(start), firstAfter(end),
+            {{start, valueBefore(start)}, {end, valueBehind(end)}});
+}
 
-    const Point left = insertPoint(context, transaction, start, valueBefore(start));
-    const Point right = insertPoint(context, transaction, end, valueBehind(end));
-    for (auto point = first; point != last; ++point)
+void AutomationCurve::hold(IHostContext* context, IEditTransaction& transaction, double start, double end)
+{
+    if (!m_points.empty())
+        level(context, transaction, start, end, valueBefore(start));
+}
+
+void AutomationCurve::holdBackwards(IHostContext* context, IEditTransaction& transaction, double start, double end)
+{
+    if (!m_points.empty())
+        level(context, transaction, start, end, valueBehind(end));
+}
+
+void AutomationCurve::holdLast(IHostContext* context, IEditTransaction& transaction, double start, double end)
+{
+    if (m_points.empty() || firstAfter(end) < m_points.size()) {
+        hold(context, transaction, start, end);
+        return;
+    }
+    const double value = valueBefore(start);
+    const bool isSteady = std::all_of(m_points.begin() + static_cast<std::ptrdiff_t>(firstAt(start)), m_points.end(),
+                                      [value](const Point& point) { return point.value == value; });
+    if (!isSteady)
+        replace(context, transaction, firstAt(start), m_points.size(), {{start, value}});
+}
+
+bool AutomationCurve::isLevel(double start, double end, double value) const
+{
+    const auto from = m_points.begin() + static_cast<std::ptrdiff_t>(firstAfter(start));
+    const auto to = m_points.begin() + static_cast<std::ptrdiff_t>(firstAt(end));
+    return valueBehind(start) == value && valueBefore(end) == value &&
+           std::all_of(from, to, [value](const Point& point) { return point.value == value; });
+}
+
+void AutomationCurve::level(IHostContext* context, IEditTransaction& transaction, double start, double end,
+                            double value)
+{
+    if (!isBefore(start, end) || isLevel(start, end, value))
+        return;
+    const Place before{start, valueBefore(start)};
+    const Place behind{end, valueBehind(end)};
+    std::vector<Place> places{{start, value}, {end, value}};
+    if (before.value != value)
+        places.insert(places.begin(), before);
+    if (behind.value != value)
+        places.push_back(behind);
+    replace(context, transaction, firstAt(start), firstAfter(end), places);
+}
+
+void AutomationCurve::replace(IHostContext* context, IEditTransaction& transaction, std::size_t first, std::size_t last,
+                              const std::vector<Place>& places)
+{
+    const auto from = m_points.begin() + static_cast<std::ptrdiff_t>(first);
+    const auto to = m_points.begin() + static_cast<std::ptrdiff_t>(last);
+    for (auto point = from; point != to; ++point)
         requireOk(transaction.remove(m_curve.get(), point->node.get()));
-
-    m_points.insert(m_points.erase(first, last), {left, right});
+    std::vector<Point> inserted;
+    for (const Place& place : places)
+        inserted.push_back(insertPoint(context, transaction, place.time, place.value));
+    m_points.insert(m_points.erase(from, to), inserted.begin(), inserted.end());
 }
 
 std::size_t AutomationCurve::firstAt(double time) const

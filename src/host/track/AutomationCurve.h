@@ -40,11 +40,32 @@ public:
     ///                start  end
     void fill(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end);
 
+    // Stretches that one value takes. A curve that has the value there already stays as it is, and so does one without
+    // points. A stretch shorter than an instant is none.
+
+    /// Keeps what the curve has come to at `start` up to `end`, where it steps to what it goes on with.
+    ///
+    ///     before   --\  .--.  /--          after   --.      ./--
+    ///                 \_|  |_/                        `-----|
+    ///                start  end
+    void hold(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end);
+    /// Has what the curve goes on with at `end` from `start` on, where it steps from what it has come to.
+    void holdBackwards(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start,
+                       double end);
+    /// As hold, but for good where no point stands after `end`.
+    void holdLast(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end);
+
 private:
     struct Point {
         double time;
         double value;
         Velmark::Counted<Velmark::IProjectNode> node;
+    };
+
+    /// A new point.
+    struct Place {
+        double time;
+        double value;
     };
 
     /// The first point that doesn't stand before the time, and the first that stands after it, by index.
@@ -55,6 +76,13 @@ private:
     /// What the curve comes to and goes on from at a time; they differ where several points stand.
     double valueBefore(double time) const;
     double valueBehind(double time) const;
+    /// Whether the curve has the value all the way from just after the one time to just before the other.
+    bool isLevel(double start, double end, double value) const;
+    void level(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end,
+               double value);
+    /// Puts new points in the place of those from `first` up to `last`, by index.
+    void replace(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, std::size_t first,
+                 std::size_t last, const std::vector<Place>& places);
     Point insertPoint(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double time,
                       double value) const;
 

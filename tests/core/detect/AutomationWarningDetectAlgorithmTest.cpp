@@ -277,11 +277,79 @@ TEST(AutomationWarningDetectAlgorithm, TrackIsNamedOnceHoweverManyOfItsCurvesJum
     EXPECT_EQ(film.detect(), Entries{warningAt(3610.0, 3610.0, "Dialogue ")});
 }
 
-TEST(AutomationWarningDetectAlgorithm, RangesWithAGapOfOneFrameDoNotMeet)
+//     volume        0.2         0.2          0.7
+//     cuts      |-- first --|---------|-- second --|         held over the gap, it jumps at the end of it
+TEST(AutomationWarningDetectAlgorithm, CurveThatJumpsAfterAGapIsMarkedWhereTheGapEnds)
 {
+    const auto detectedAfter = [](const char* dstOut, double value) {
+        AutomationFilm film;
+        film.carryOver("01:00:00:00", dstOut, {film.first(L"Dialogue", volume(constant(0.2)), 3605.0)});
+        film.carryOver("01:00:10:00", "01:00:20:00", {film.second(L"Dialogue", volume(constant(value)))});
+        return film.detect();
+    };
+
+    EXPECT_EQ(detectedAfter("01:00:09:24", 0.7), Entries{warningAt(3610.0, 3610.0, "Dialogue ")});
+    EXPECT_EQ(detectedAfter("01:00:05:00", 0.7), Entries{warningAt(3610.0, 3610.0, "Dialogue ")});
+    EXPECT_EQ(detectedAfter("01:00:05:00", 0.2101), Entries{warningAt(3610.0, 3610.0, "Dialogue ")});
+    EXPECT_EQ(detectedAfter("01:00:05:00", 0.21), Entries{});
+    EXPECT_EQ(detectedAfter("01:00:05:00", 0.2), Entries{});
+}
+
+TEST(AutomationWarningDetectAlgorithm, TracksOfAGapShareOneEntryThatHoldsAllItsEnds)
+{
+    const Automation low = volume(constant(0.2));
+    const Automation high = volume(constant(0.7));
     AutomationFilm film;
-    film.carryOver("01:00:00:00", "01:00:09:24", {film.first(L"Dialogue", volume(constant(0.2)))});
+    film.carryOver("01:00:00:00", "01:00:05:00",
+                   {film.first(L"Dialogue", low, 3605.0), film.first(L"Music", low, 3605.5)});
+    film.carryOver("01:00:10:00", "01:00:20:00", {film.second(L"Dialogue", high), film.second(L"Music", high, 3610.5)});
+
+    EXPECT_EQ(film.detect(), Entries{warningAt(3610.0, 3610.5, "Dialogue Music ")});
+}
+
+TEST(AutomationWarningDetectAlgorithm, CurveThatIsLedOverGapsJumpsOnlyWhereRangesMeet)
+{
+    const Automation low = volume(constant(0.2));
+    AutomationFilm film;
+    film.model.settings().setCreateVirginTerritories(true);
+    film.carryOver("01:00:00:00", "01:00:09:24", {film.first(L"Dialogue", low)});
     film.carryOver("01:00:10:00", "01:00:20:00", {film.second(L"Dialogue", volume(constant(0.7)))});
+    EXPECT_EQ(film.detect(), Entries{});
+
+    film.carryOver("01:00:20:00", "01:00:30:00", {film.second(L"Dialogue", low, 3620.0)});
+    EXPECT_EQ(film.detect(), Entries{warningAt(3620.0, 3620.0, "Dialogue ")});
+}
+
+//     cuts      |-------- long --------|     |-- second --|        what is before the gap is the end of the long one
+//                    |-- short --|
+TEST(AutomationWarningDetectAlgorithm, BeforeAGapStandsTheCutThatEndsLast)
+{
+    const auto detectedWith = [](double ofLong, double ofShort) {
+        AutomationFilm film;
+        film.carryOver("01:00:00:00", "01:00:08:00", {film.first(L"Dialogue", volume(constant(ofLong)), 3608.0)});
+        film.carryOver(
+            "01:00:01:00", "01:00:05:00",
+            {std::make_shared<TellingCutEvent>(L"Dialogue", SecondsRange{100.0, 104.0}, SecondsRange{3601.0, 3605.0},
+                                               volume(constant(ofShort)), volume(constant(ofShort)))});
+        film.carryOver("01:00:10:00", "01:00:20:00", {film.second(L"Dialogue", volume(constant(0.7)))});
+        return film.detect();
+    };
+
+    EXPECT_EQ(detectedWith(0.7, 0.2), Entries{});
+    EXPECT_EQ(detectedWith(0.2, 0.7), Entries{warningAt(3610.0, 3610.0, "Dialogue ")});
+}
+
+TEST(AutomationWarningDetectAlgorithm, CutThatBeginsWithinALongerOneHasNoGapBeforeIt)
+{
+    const auto within = [](double dstIn, double value) {
+        return std::make_shared<TellingCutEvent>(L"Dialogue", SecondsRange{100.0, 101.0},
+                                                 SecondsRange{dstIn, dstIn + 1.0}, volume(constant(value)),
+                                                 volume(constant(value)));
+    };
+    AutomationFilm film;
+    film.carryOver("01:00:00:00", "01:00:10:00", {film.first(L"Dialogue", volume(constant(0.2)))});
+    film.carryOver("01:00:02:00", "01:00:03:00", {within(3602.0, 0.4)});
+    film.carryOver("01:00:05:00", "01:00:06:00", {within(3605.0, 0.7)});
 
     EXPECT_EQ(film.detect(), Entries{});
 }
@@ -300,6 +368,7 @@ TEST(AutomationWarningDetectAlgorithm, NumbersLeftOutInDropFrameAreNoFramesBetwe
     // 00:01:00;02 is the frame behind 00:00:59;29.
     const auto countForEnd = [](const char* dstOut) {
         AutomationFilm film(Framerate(30, true, 1));
+        film.model.settings().setCreateVirginTerritories(true);
         film.carryOver("00:00:00:00", dstOut, {film.first(L"Dialogue", volume(constant(0.2)))});
         film.carryOver("00:01:00:02", "00:02:00:02", {film.second(L"Dialogue", volume(constant(0.7)))});
         return film.detect().size();
@@ -463,16 +532,21 @@ TEST(AutomationWarningDetectAlgorithm, StepsPerTrackEndWithTheShorterCutAndTheLa
     EXPECT_EQ(other.steps(), 2U);
 }
 
-TEST(AutomationWarningDetectAlgorithm, PairThatDoesNotMeetReportsAllTracksOfTheSecond)
+TEST(AutomationWarningDetectAlgorithm, PairThatOverlapsReportsAllTracksOfTheSecondAndAPairWithAGapWhatOneThatMeetsDoes)
 {
-    AutomationFilm film;
     const auto low = volume(constant(0.2));
-    film.carryOver("01:00:00:00", "01:00:09:00", {film.first(L"A", low), film.first(L"B", low)});
-    film.carryOver("01:00:10:00", "01:00:20:00", {film.second(L"A", low), film.second(L"B", low)});
-    RecordingProgress progress;
+    const auto stepsAfter = [&](const char* dstOut) {
+        AutomationFilm film;
+        film.carryOver("01:00:00:00", dstOut, {film.first(L"A", low), film.first(L"B", low)});
+        film.carryOver("01:00:10:00", "01:00:20:00", {film.second(L"A", low), film.second(L"B", low)});
+        RecordingProgress progress;
+        EXPECT_EQ(film.detect(&progress), Entries{});
+        return progress.steps();
+    };
 
-    EXPECT_EQ(film.detect(&progress), Entries{});
-    EXPECT_EQ(progress.steps(), 2U);
+    EXPECT_EQ(stepsAfter("01:00:11:00"), 2U);
+    EXPECT_EQ(stepsAfter("01:00:10:00"), 4U);
+    EXPECT_EQ(stepsAfter("01:00:09:00"), 4U);
 }
 
 TEST(AutomationWarningDetectAlgorithm, StopsBehindThePairDuringWhichTheUserCancels)

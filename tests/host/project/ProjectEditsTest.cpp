@@ -785,6 +785,12 @@ protected:
         return edit(
             [&](Project& project, IEditTransaction& transaction) { project.markVirginTerritories(transaction, cuts); });
     }
+    Result::Type hold(bool isWholeProgramme = true)
+    {
+        return edit([&](Project& project, IEditTransaction& transaction) {
+            project.holdAutomation(transaction, cuts, isWholeProgramme);
+        });
+    }
     /// The times of the points, in seconds of the preview's copy of the film.
     std::vector<double> points(const TrackHost::Node& ofTrack)
     {
@@ -887,6 +893,101 @@ TEST_P(ProjectVirginTerritoryTest, GapsNeedTheOffset)
     host.adapter.resetPreviewOffset();
 
     EXPECT_EQ(mark(), Result::NotAvailable);
+}
+
+TEST_P(ProjectVirginTerritoryTest, AutomationKeepsItsValueBetweenCutsThatDoNotMeet)
+{
+    EXPECT_EQ(hold(), Result::Ok);
+
+    // Half the way from 0.2 to 0.8 at 20 s, and 0.8 at 30 s.
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, GapsOfHeldAutomationAreThoseOfTheProgrammeInAnyOrderOfTheList)
+{
+    listCuts({{"01:00:40:00", "01:00:50:00"}, {"01:00:10:00", "01:00:20:00"}, {"01:00:30:00", "01:00:40:00"}});
+
+    hold();
+
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, AGapShorterThanAnInstantIsNone)
+{
+    const auto gapOf = [&](double seconds) {
+        listCuts({{"01:00:10:00", "01:00:20:00"}, {"01:00:20:00", "01:00:50:00"}});
+        cuts.cutAt(1)->cutEvents()[0]->setDstIn(3620.0 + seconds);
+        hold();
+    };
+    const std::vector<double> before = points(track);
+
+    gapOf(0.9 / 384000);
+    EXPECT_EQ(points(track), before);
+
+    gapOf(1.1 / 384000);
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 20.0, 20.0, 25.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, AutomationHasItsFirstValueBeforeTheFirstCut)
+{
+    listCuts({{"01:00:30:00", "01:00:50:00"}});
+
+    hold();
+
+    // From the very beginning of the clock, which is an hour before the film.
+    EXPECT_EQ(points(track), (std::vector<double>{-3600.0, -3600.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, AutomationKeepsItsLastValueAfterTheLastCutOfARun)
+{
+    const std::vector<double> before = points(track);
+    listCuts({{"01:00:10:00", "01:00:20:00"}});
+
+    hold(false);
+    EXPECT_EQ(points(track), before);
+
+    hold(true);
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, ARestrictedRunHoldsTheAutomationInItsRange)
+{
+    settings().setRestrictRange(true);
+    settings().setPreserveMaterial(3605.0, 3630.0);
+    listCuts({{"01:00:10:00", "01:00:20:00"}});
+
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+
+    settings().setPreserveMaterial(3635.0, 3640.0);
+    listCuts({{"01:00:40:00", "01:00:50:00"}});
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, OfLockedAndUnselectedTracksNoAutomationIsHeld)
+{
+    const auto before = points(track);
+    settings().setApplyTo(core::ApplyTo::SelectedTracks);
+    hold();
+    EXPECT_EQ(points(track), before);
+
+    select(track);
+    lock(track);
+    hold();
+    EXPECT_EQ(points(track), before);
+}
+
+TEST_P(ProjectVirginTerritoryTest, WithoutCutsNoAutomationIsHeld)
+{
+    const auto before = points(track);
+    cuts.clear();
+
+    EXPECT_EQ(hold(), Result::Ok);
+
+    EXPECT_EQ(points(track), before);
+    host.adapter.resetPreviewOffset();
+    EXPECT_EQ(hold(), Result::NotAvailable);
 }
 
 } // namespace cadrel::host

@@ -68,6 +68,33 @@ public:
         });
     }
 
+    /// Does something to a curve as it stands, in a transaction.
+    template <typename Change>
+    void change(int32 number, Change change)
+    {
+        edit(u"Change", [&] {
+            AutomationCurve changed = curve(number);
+            change(changed);
+        });
+    }
+    /// Hold a stretch of the volume, by times of the host.
+    void hold(double start, double end)
+    {
+        change(Volume,
+               [&](AutomationCurve& curve) { curve.hold(context(), *transaction(), clock(start), clock(end)); });
+    }
+    void holdBackwards(double start, double end)
+    {
+        change(Volume, [&](AutomationCurve& curve) {
+            curve.holdBackwards(context(), *transaction(), clock(start), clock(end));
+        });
+    }
+    void holdLast(double start, double end)
+    {
+        change(Volume,
+               [&](AutomationCurve& curve) { curve.holdLast(context(), *transaction(), clock(start), clock(end)); });
+    }
+
     const Node node = addTrack(TypeWord::Audio, u"FX");
     const Track track = handle(node);
 };
@@ -261,6 +288,133 @@ TEST_P(AutomationCurveTest, FilledGapsAreUndoneWithTheirTransaction)
     EXPECT_EQ(host.dump(), before);
 }
 
+//     before   1.0 --|          |-- 0.5         after   1.0 -------------|
+//                    |___0.0____|                                        |-- 0.5
+TEST_P(AutomationCurveTest, AHeldStretchKeepsWhatTheCurveComesToAndStepsAtItsEnd)
+{
+    host.set(Volume,
+             {{5.0, 1.0F}, {10.0, 1.0F}, {10.0, 0.0F}, {15.0, 0.25F}, {20.0, 0.0F}, {20.0, 0.5F}, {25.0, 0.5F}});
+
+    host.hold(10.0, 20.0);
+
+    EXPECT_EQ(host.points(Volume), (Points{{5.0, 1.0F}, {10.0, 1.0F}, {20.0, 1.0F}, {20.0, 0.5F}, {25.0, 0.5F}}));
+}
+
+TEST_P(AutomationCurveTest, AStretchThatIsHeldBackwardsHasWhatTheCurveGoesOnWithAndStepsAtItsStart)
+{
+    host.set(Volume,
+             {{5.0, 1.0F}, {10.0, 1.0F}, {10.0, 0.0F}, {15.0, 0.25F}, {20.0, 0.0F}, {20.0, 0.5F}, {25.0, 0.75F}});
+
+    host.holdBackwards(10.0, 20.0);
+
+    EXPECT_EQ(host.points(Volume), (Points{{5.0, 1.0F}, {10.0, 1.0F}, {10.0, 0.5F}, {20.0, 0.5F}, {25.0, 0.75F}}));
+}
+
+TEST_P(AutomationCurveTest, AHeldStretchOnASlopeLeavesTheSlopeOutsideOfIt)
+{
+    host.set(Volume, {{0.0, 0.0F}, {40.0, 1.0F}});
+
+    host.hold(10.0, 20.0);
+    EXPECT_EQ(host.points(Volume), (Points{{0.0, 0.0F}, {10.0, 0.25F}, {20.0, 0.25F}, {20.0, 0.5F}, {40.0, 1.0F}}));
+
+    host.holdBackwards(24.0, 32.0);
+    EXPECT_EQ(host.points(Volume), (Points{{0.0, 0.0F},
+                                           {10.0, 0.25F},
+                                           {20.0, 0.25F},
+                                           {20.0, 0.5F},
+                                           {24.0, 0.6F},
+                                           {24.0, 0.8F},
+                                           {32.0, 0.8F},
+                                           {40.0, 1.0F}}));
+}
+
+TEST_P(AutomationCurveTest, AStretchThatIsLevelAlreadyGetsNoPoints)
+{
+    const Points level{{5.0, 1.0F}, {10.0, 0.5F}, {15.0, 0.5F}, {20.0, 0.5F}, {20.0, 1.0F}, {25.0, 0.0F}};
+    host.set(Volume, level);
+
+    host.hold(10.0, 20.0);
+    host.hold(12.0, 18.0);
+    host.holdBackwards(10.0, 18.0);
+    host.hold(30.0, 40.0);
+    host.holdBackwards(1.0, 5.0);
+
+    EXPECT_EQ(host.points(Volume), level);
+    // The slope before it ends with it.
+    host.hold(9.0, 20.0);
+    EXPECT_NE(host.points(Volume), level);
+}
+
+TEST_P(AutomationCurveTest, AnOutlierInAStretchIsHeldOver)
+{
+    host.set(Volume, {{10.0, 0.5F}, {14.0, 0.5F}, {15.0, 1.0F}, {16.0, 0.5F}, {20.0, 0.5F}});
+
+    host.hold(12.0, 18.0);
+
+    EXPECT_EQ(host.points(Volume), (Points{{10.0, 0.5F}, {12.0, 0.5F}, {18.0, 0.5F}, {20.0, 0.5F}}));
+}
+
+TEST_P(AutomationCurveTest, AStretchShorterThanAnInstantOrReversedIsNotHeld)
+{
+    const Points slope{{0.0, 0.0F}, {40.0, 1.0F}};
+    host.set(Volume, slope);
+
+    host.hold(20.0, 10.0);
+    host.hold(10.0, 10.0);
+    host.hold(10.0, 10.0 + 0.9 / 384000);
+    host.holdBackwards(10.0, 10.0 + 0.9 / 384000);
+    EXPECT_EQ(host.points(Volume), slope);
+
+    host.hold(10.0, 10.0 + 1.1 / 384000);
+    EXPECT_EQ(host.points(Volume).size(), 5U);
+}
+
+TEST_P(AutomationCurveTest, ACurveWithoutPointsIsNotHeld)
+{
+    host.hold(10.0, 20.0);
+    host.holdBackwards(10.0, 20.0);
+    host.holdLast(10.0, 20.0);
+
+    EXPECT_EQ(host.points(Volume), Points());
+}
+
+TEST_P(AutomationCurveTest, WhatACurveComesToLastIsHeldForGood)
+{
+    host.set(Volume, {{5.0, 1.0F}, {10.0, 0.5F}, {10.0, 0.0F}, {15.0, 0.25F}, {20.0, 0.75F}});
+
+    host.holdLast(10.0, 20.0);
+    EXPECT_EQ(host.points(Volume), (Points{{5.0, 1.0F}, {10.0, 0.5F}}));
+
+    host.holdLast(10.0, 20.0);
+    host.holdLast(30.0, 40.0);
+    EXPECT_EQ(host.points(Volume), (Points{{5.0, 1.0F}, {10.0, 0.5F}}));
+}
+
+TEST_P(AutomationCurveTest, WhatACurveComesToLastIsHeldUpToTheEndWherePointsStandAfterIt)
+{
+    host.set(Volume, {{10.0, 0.5F}, {10.0, 0.0F}, {21.0, 0.0F}, {30.0, 1.0F}});
+
+    host.holdLast(10.0, 20.0);
+
+    EXPECT_EQ(host.points(Volume), (Points{{10.0, 0.5F}, {20.0, 0.5F}, {20.0, 0.0F}, {21.0, 0.0F}, {30.0, 1.0F}}));
+}
+
+TEST_P(AutomationCurveTest, HeldStretchesAreUndoneWithTheirTransaction)
+{
+    host.set(Volume, {{0.0, 0.0F}, {15.0, 1.0F}, {30.0, 0.25F}});
+    const std::string before = host.dump();
+
+    host.hold(10.0, 20.0);
+    ASSERT_NE(host.dump(), before);
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.dump(), before);
+
+    host.holdLast(10.0, 40.0);
+    ASSERT_NE(host.dump(), before);
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.dump(), before);
+}
+
 TEST_P(AutomationCurveTest, TracksWithoutAutomationHaveNoCurves)
 {
     EXPECT_TRUE(host.handle(host.addTrack(TypeWord::Marker, u"Memos")).prepareVirginRange().empty());
@@ -303,31 +457,67 @@ TEST_P(AutomationCurveTest, MissesPointsWhereTheHostMakesNone)
               Result::HostObjectMissing);
 }
 
-RC_GTEST_PROP(AutomationCurveLaw, FillingAGapChangesNothingOutsideOfItAndIsStraightInside, ())
-{
-    OneTrack host(*rc::gen::element(0.0, 3600.0));
-    const auto drawn = *rc::gen::nonEmpty(rc::gen::container<std::vector<std::pair<int, int>>>(
-        rc::gen::pair(rc::gen::inRange(0, 32), rc::gen::inRange(0, 17))));
-    for (const auto& [time, value] : drawn)
-        host.addPoint(host.node, Volume, time, static_cast<float>(value) / 16.0F);
+/// A curve with random points, and what it came to and went on with at each quarter of a second up to 40 s.
+class RandomVolume : public OneTrack {
+public:
+    RandomVolume() : OneTrack(*rc::gen::element(0.0, 3600.0))
+    {
+        const auto drawn = *rc::gen::nonEmpty(rc::gen::container<std::vector<std::pair<int, int>>>(
+            rc::gen::pair(rc::gen::inRange(0, 32), rc::gen::inRange(0, 17))));
+        for (const auto& [time, value] : drawn)
+            addPoint(node, Volume, time, static_cast<float>(value) / 16.0F);
+        for (int time = 0; time <= Quarters; ++time)
+            m_before.emplace_back(*envelope(Volume).valueBefore(time / 4.0), *envelope(Volume).valueBehind(time / 4.0));
+    }
+
+    double cameTo(double time) const { return m_before[static_cast<std::size_t>(time * 4.0)].first; }
+    double wentOnWith(double time) const { return m_before[static_cast<std::size_t>(time * 4.0)].second; }
+
+    /// Asserts that the curve is as it was but for the stretch, in which it has the values that are given.
+    template <typename Value>
+    void expectChanged(double from, double to, Value valueInside)
+    {
+        const auto isSame = [](double a, double b) { return std::abs(a - b) < 1e-6; };
+        for (int quarter = 0; quarter <= Quarters; ++quarter) {
+            const double time = quarter / 4.0;
+            const double before = time > from && time <= to ? valueInside(time) : cameTo(time);
+            const double behind = time >= from && time < to ? valueInside(time) : wentOnWith(time);
+            RC_ASSERT(isSame(*envelope(Volume).valueBefore(time), before));
+            RC_ASSERT(isSame(*envelope(Volume).valueBehind(time), behind));
+        }
+    }
+
     const double start = *rc::gen::inRange(0, 60) / 2.0;
     const double end = start + *rc::gen::inRange(1, 20) / 2.0;
-    std::vector<std::pair<double, double>> before;
-    for (int time = 0; time <= 160; ++time)
-        before.emplace_back(*host.envelope(Volume).valueBefore(time / 4.0),
-                            *host.envelope(Volume).valueBehind(time / 4.0));
-    const auto coming = [&](double time) { return before[static_cast<std::size_t>(time * 4.0)].first; };
-    const auto going = [&](double time) { return before[static_cast<std::size_t>(time * 4.0)].second; };
 
-    host.fill(start, end);
+private:
+    static constexpr int Quarters = 160;
 
-    const auto isSame = [](double a, double b) { return std::abs(a - b) < 1e-6; };
-    for (int quarter = 0; quarter <= 160; ++quarter) {
-        const double time = quarter / 4.0;
-        const double straight = std::lerp(coming(start), going(end), (time - start) / (end - start));
-        const bool isInside = time >= start && time <= end;
-        RC_ASSERT(isSame(*host.envelope(Volume).valueBefore(time), isInside ? straight : coming(time)));
-        RC_ASSERT(isSame(*host.envelope(Volume).valueBehind(time), isInside ? straight : going(time)));
+    std::vector<std::pair<double, double>> m_before;
+};
+
+RC_GTEST_PROP(AutomationCurveLaw, FillingAGapChangesNothingOutsideOfItAndIsStraightInside, ())
+{
+    RandomVolume host;
+
+    host.fill(host.start, host.end);
+
+    host.expectChanged(host.start, host.end, [&](double time) {
+        return std::lerp(host.cameTo(host.start), host.wentOnWith(host.end),
+                         (time - host.start) / (host.end - host.start));
+    });
+}
+
+RC_GTEST_PROP(AutomationCurveLaw, HoldingAStretchChangesNothingOutsideOfItAndIsLevelInside, ())
+{
+    RandomVolume host;
+
+    if (*rc::gen::arbitrary<bool>()) {
+        host.hold(host.start, host.end);
+        host.expectChanged(host.start, host.end, [&](double) { return host.cameTo(host.start); });
+    } else {
+        host.holdBackwards(host.start, host.end);
+        host.expectChanged(host.start, host.end, [&](double) { return host.wentOnWith(host.end); });
     }
 }
 
