@@ -54,7 +54,8 @@ ol.largest a { color: inherit; }
 @media (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
 @media print { :root { --paper: #fff; --card: #fff; } body { padding: 0; font-size: 10pt; } .tools { display: none; }
   * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2 { break-after: avoid; }
-  svg { height: 150px; } }
+  svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } td.tc { font-size: 8pt; }
+  tr.k td { font-size: 7.5pt; } }
 )";
 
 const std::string_view NotesPage::Script = R"(

@@ -29,6 +29,7 @@ using core::WorkPlace;
 namespace {
 
 constexpr std::int32_t FramesPerFoot = 16;
+constexpr std::size_t MostCharactersOfAName = 39;
 
 constexpr std::array<std::string_view, 12> KindWords{
     "head-trimmed", "tail-trimmed", "lifted",          "inserted",         "replaced",           "moved",
@@ -225,10 +226,11 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     }
     case ChangeKind::Replaced:
         return {"replaced " + length, name, "was " + nameOf(change.oldShot) + oldPlace()};
-    case ChangeKind::Moved:
-        return {"moved " + length + oldPlace(),
-                name + (change.shots > 1 ? " and " + std::to_string(change.shots - 1) + " more" : ""),
-                {}};
+    case ChangeKind::Moved: {
+        const std::string more =
+            change.shots > 1 ? concatenated({" and ", std::to_string(change.shots - 1), " more"}) : "";
+        return {"moved " + length + oldPlace(), toPrintable(name, MostCharactersOfAName - more.size()).text + more, {}};
+    }
     case ChangeKind::Doubled:
         return {"once more " + length, name, "stood once in the old cut" + oldPlace()};
     case ChangeKind::Retimed:
@@ -238,7 +240,7 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
                 {}};
     case ChangeKind::VersionChanged:
         return {"was " + toPrintable(change.oldShot == nullptr ? "" : change.oldShot->rollName(), 28).text,
-                toPrintable(shot == nullptr ? "" : shot->rollName(), 39).text,
+                toPrintable(shot == nullptr ? "" : shot->rollName(), MostCharactersOfAName).text,
                 {}};
     case ChangeKind::TransitionAdded:
     case ChangeKind::TransitionRemoved:
@@ -308,7 +310,7 @@ std::string NotesWording::nameOf(const EventBase* shot)
 {
     if (shot == nullptr)
         return "no picture";
-    return toPrintable(shot->clipName().empty() ? shot->rollName() : shot->clipName(), 39).text;
+    return toPrintable(shot->clipName().empty() ? shot->rollName() : shot->clipName(), MostCharactersOfAName).text;
 }
 
 } // namespace cadrel::app

@@ -5,6 +5,8 @@
 #include "tests/app/ProgramRun.h"
 #include "tests/support/TreePaths.h"
 
+#include <algorithm>
+#include <cstddef>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <sstream>
@@ -106,6 +108,30 @@ TEST(Notes, NoLineOfTheTextIsWiderThan80Columns)
 
     for (const std::string& line : linesOf(outcome.out))
         EXPECT_LE(line.size(), 80U) << line;
+}
+
+TEST(Notes, LongNamesMakeNoLineWider)
+{
+    const std::string name(60, 'N');
+    const auto shot = [&name](const char* number, const char* roll, const char* source, const char* place) {
+        return cut(number, roll, source, place) + clipName(name);
+    };
+    const Cuts film(shot("001", "A001", "10:00:00:00 10:00:09:12", "01:00:00:00 01:00:09:12") +
+                        shot("002", "A002", "10:00:00:00 10:00:01:00", "01:00:09:12 01:00:10:12") +
+                        shot("003", "A003", "10:00:00:00 10:00:01:00", "01:00:10:12 01:00:11:12"),
+                    shot("001", "A002", "10:00:00:00 10:00:01:00", "01:00:00:00 01:00:01:00") +
+                        shot("002", "A003", "10:00:00:00 10:00:01:00", "01:00:01:00 01:00:02:00") +
+                        shot("003", "A001", "10:00:00:00 10:00:09:12", "01:00:02:00 01:00:11:12") +
+                        shot("004", "A009", "10:00:00:00 10:00:09:12", "01:00:11:12 01:00:21:00"));
+
+    const Outcome outcome = film.notes({"--feet"});
+
+    EXPECT_NE(outcome.out.find(" and 1 more"), std::string::npos) << outcome.out;
+    for (const std::string& line : linesOf(outcome.out)) {
+        // The sign that a name goes on has three bytes.
+        const auto cutNames = std::count(line.begin(), line.end(), '\xE2');
+        EXPECT_LE(static_cast<std::ptrdiff_t>(line.size()) - 2 * cutNames, 80) << line;
+    }
 }
 
 TEST(Notes, FeetCountTheLastFrameIn)

@@ -64,8 +64,8 @@ enum class StepAction {
     Relabel, ///< the frames at `place` stay and are replaced by `inserted`, which show another version of them
 };
 
-/// One step of the way from the old cut to the new one. Steps are in the order of the new programme. Before the place of a
-/// step, all is as it is in the new cut.
+/// One step of the way from the old cut to the new one. Steps are in the order of the new programme. Before the place of
+/// a step that replaces, all is as it is in the new cut.
 struct NoteStep {
     StepAction action = StepAction::Replace;
     WorkPlace place;

@@ -158,7 +158,7 @@ private:
             addRemoved(m_around.afterInOld == m_around.afterInNew ? m_head : m_otherHead, last);
     }
 
-    void addRemoved(Trim& trim, ShotPiece& piece) const
+    void addRemoved(Trim& trim, ShotPiece& piece)
     {
         trim.removed = piece.frames.length;
         trim.oldShot = shotOf(m_oldCut, piece.event);
@@ -167,7 +167,7 @@ private:
         piece.isTold = true;
     }
 
-    void addInserted(Trim& trim, ShotPiece& piece) const
+    void addInserted(Trim& trim, ShotPiece& piece)
     {
         trim.inserted = piece.frames.length;
         trim.newShot = shotOf(m_newCut, piece.event);
@@ -372,8 +372,8 @@ private:
     Trim m_head;      ///< of the shot after it
     Trim m_otherTail; ///< of the shot that stood before it in the old cut alone
     Trim m_otherHead;
-    mutable bool m_oldTransition = false;
-    mutable bool m_newTransition = false;
+    bool m_oldTransition = false;
+    bool m_newTransition = false;
     std::vector<PictureChange> m_changes;
 };
 

@@ -224,8 +224,13 @@ private:
             m_waiting.push_back(slot);
             break;
         case Slot::Kind::Origin:
-            if (!m_isInPlace[what.index])
-                rows.emplace_back(move(what.index));
+            if (m_isInPlace[what.index])
+                break;
+            if (const Slot& next = nextThatStays(slot); next.kind == Slot::Kind::Block)
+                replaceWaiting(m_blocks[next.index].first);
+            else if (next.kind == Slot::Kind::End)
+                replaceWaiting(std::nullopt);
+            rows.emplace_back(move(what.index));
             break;
         case Slot::Kind::Block:
             replaceWaiting(m_blocks[what.index].first);
@@ -241,6 +246,15 @@ private:
             m_lastKept.reset();
             break;
         }
+    }
+
+    /// The first slot after one that isn't the origin of a block. Where more is to be replaced there, what waits is
+    /// replaced together with it, after the moves.
+    const Slot& nextThatStays(std::size_t slot) const
+    {
+        while (m_slots[slot].kind == Slot::Kind::Origin)
+            ++slot;
+        return m_slots[slot];
     }
 
     void keep(std::size_t slot)

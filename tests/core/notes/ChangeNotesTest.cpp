@@ -221,6 +221,30 @@ TEST_F(ChangeNotesTest, ASceneMovesAsOneAndIsTrimmedAtItsNewPlace)
     EXPECT_EQ(textOf(film.steps()), (Texts{"150 from 500 at 0: moved 150;", "-10 +0 at 90: tail -10;"}));
 }
 
+TEST_F(ChangeNotesTest, AShotMovesOutFromBetweenShotsThatGoInOneStepAndTheyGoInAnother)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"X", 0, 8}, {"B", 0, 30}, {"Y", 0, 9}, {"C", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 50}, {"B", 0, 30}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"30 from 108 at 167: moved 30;", "-17 +0 at 100: lifted 8; lifted 9;"}));
+}
+
+TEST_F(ChangeNotesTest, WhatGoesBeforeAShotThatMovesOutGoesFirst)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"X", 0, 8}, {"B", 0, 30}, {"C", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 50}, {"B", 0, 30}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"-8 +0 at 100: lifted 8;", "30 from 100 at 150: moved 30;"}));
+}
+
+TEST_F(ChangeNotesTest, OldShotsGoInTheStepThatInsertsNewOnes)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"X", 0, 8}, {"C", 0, 50}, {"B", 0, 30}}),
+                     reelOf({{"A", 0, 100}, {"B", 0, 30}, {"N", 0, 9}, {"C", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"30 from 158 at 100: moved 30;", "-8 +9 at 130: lifted 8; inserted 9;"}));
+}
+
 TEST_F(ChangeNotesTest, ADoubledShotTellsWhereItStandsAsWell)
 {
     const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}}), reelOf({{"A", 0, 100}, {"B", 0, 50}, {"A", 20, 30}}));

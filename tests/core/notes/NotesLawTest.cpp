@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "core/notes/ChangeNotes.h"
 #include "core/notes/KeptStretches.h"
 #include "core/notes/StepMaker.h"
 #include "tests/core/TestProject.h"
@@ -54,6 +55,12 @@ std::string playAll(const EventList& oldCut, const EventList& newCut, const Pict
                 return "a step tells of no change";
             if (step->action == StepAction::Replace && !player.isDoneBefore(step->place))
                 return "what lies before a step isn't done";
+            std::size_t doubled = 0;
+            for (const PictureChange& change : step->changes) {
+                if (change.kind == ChangeKind::Doubled &&
+                    !player.showsAt(step->doubledFrom.at(doubled++), change.inNew->start))
+                    return "what is doubled stands elsewhere";
+            }
             player.carryOut(*step);
         }
     }
@@ -96,6 +103,23 @@ RC_GTEST_PROP(NotesLaw, ACutHasNoStepsToItself, ())
 
     RC_ASSERT(countSteps(stepsBetween(film.oldCut, film.oldCut, film.rules)) == 0U);
     RC_ASSERT(countSteps(stepsBetween(film.newCut, film.newCut, film.rules)) == 0U);
+}
+
+RC_GTEST_PROP(NotesLaw, TheOffsetsEndInTheChangeOfLength, ())
+{
+    const auto seed = *genRecutSeed();
+    const RandomRecut film(seed);
+    const TestProject project(film.rules.framerate);
+
+    const ChangeNotes notes(film.oldCut, film.newCut, film.rules);
+
+    const NoteTotals& totals = notes.totals();
+    RC_ASSERT(totals.kept + totals.lifted == totals.before);
+    RC_ASSERT(totals.kept + totals.doubled + totals.inserted == totals.after);
+    for (const ReelNotes& reel : notes.reels()) {
+        if (!reel.entries.empty())
+            RC_ASSERT(reel.entries.back().runningOffset == reel.after - reel.before);
+    }
 }
 
 /// The EDLs of the tree.

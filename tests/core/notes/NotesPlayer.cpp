@@ -181,4 +181,13 @@ bool NotesPlayer::isDoneBefore(const core::WorkPlace& place) const
                       [](const SeenFrame& a, const SeenFrame& b) { return a.looksLike(b); });
 }
 
+bool NotesPlayer::showsAt(const core::WorkPlace& place, int newStart) const
+{
+    const SeenFrame& seen = m_reels.at(place.reel).at(static_cast<std::size_t>(place.frame));
+    SeenFrame wanted = m_newFrames.at(static_cast<std::size_t>(newStart));
+    if (wanted.what.find("VFX") != std::string::npos && seen.what.find("VFX") != std::string::npos)
+        wanted.what = seen.what;
+    return seen.looksLike(wanted);
+}
+
 } // namespace cadrel::tests

@@ -37,7 +37,8 @@ public:
     std::string difference() const;
     /// Whether the frames before a place are already those of the new cut.
     bool isDoneBefore(const core::WorkPlace& place) const;
-    const std::vector<SeenFrame>& reel(std::size_t index) const { return m_reels[index]; }
+    /// Whether the frames at a place look like those of the new cut from `newStart` on, whatever their version.
+    bool showsAt(const core::WorkPlace& place, int newStart) const;
 
 private:
     std::vector<std::vector<SeenFrame>> m_goal; ///< by pairs of reels; empty for one that goes
