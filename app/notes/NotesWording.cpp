@@ -30,6 +30,8 @@ namespace {
 
 constexpr std::int32_t FramesPerFoot = 16;
 constexpr std::size_t MostCharactersOfAName = 39;
+/// So many events with the same doubt are named.
+constexpr std::size_t MostOfOneDoubt = 5;
 
 constexpr std::array<std::string_view, 12> KindWords{
     "head-trimmed", "tail-trimmed", "lifted",          "inserted",         "replaced",           "moved",
@@ -293,10 +295,19 @@ std::vector<std::string> NotesWording::remarks() const
 void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
 {
     const core::Programme& cut = isNew ? m_document.notes.newCut() : m_document.notes.oldCut();
+    std::array<std::size_t, DoubtWords.size()> counts{};
     for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
         const EventBase& event = cut.events().at(static_cast<std::size_t>(doubtful.event));
-        lines.push_back(toPrintable(event.edlFileName(), 40).text + ", event " + std::to_string(event.eventNumber()) +
-                        " (" + nameOf(&event) + "): " + std::string(explanationOf(doubtful.doubt)));
+        if (++counts.at(static_cast<std::size_t>(doubtful.doubt)) <= MostOfOneDoubt)
+            lines.push_back(concatenated({toPrintable(event.edlFileName(), MostCharactersOfAName).text, ", event ",
+                                          std::to_string(event.eventNumber()), " (", nameOf(&event),
+                                          "): ", explanationOf(doubtful.doubt)}));
+    }
+    for (std::size_t doubt = 0; doubt < counts.size(); ++doubt) {
+        if (counts[doubt] > MostOfOneDoubt)
+            lines.push_back(concatenated({isNew ? "New cut, " : "Old cut, ",
+                                          counted(counts[doubt] - MostOfOneDoubt, "further event"), ": ",
+                                          explanationOf(static_cast<PictureDoubt>(doubt))}));
     }
 }
 

@@ -299,6 +299,20 @@ TEST(Notes, ANameCantBreakThePage)
     EXPECT_EQ(page.find("<script>\"&"), std::string::npos);
 }
 
+TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
+{
+    std::string sound;
+    for (int event = 4; event < 11; ++event)
+        sound += "010  S001  A  C  10:00:00:00 10:00:01:00 01:00:00:00 01:00:01:00\n";
+    const Cuts film(oldCut() + sound, oldCut());
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(countOf("old.edl, event 10 (S001): no picture", outcome.out), 5) << outcome.out;
+    EXPECT_NE(outcome.out.find("Old cut, 2 further events: no picture"), std::string::npos) << outcome.out;
+}
+
 TEST(Notes, ACutHasNothingToTellOfItself)
 {
     const Cuts film(oldCut(), oldCut());
