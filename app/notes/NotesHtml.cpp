@@ -17,7 +17,7 @@
 namespace cadrel::app {
 
 using core::ChangeKind;
-using core::FrameRange;
+using core::FrameSpan;
 using core::NoteEntry;
 using core::NoteStep;
 using core::PictureChange;
@@ -200,7 +200,7 @@ private:
         }
     }
 
-    static const FrameRange& rangeOf(const NoteEntry& move) { return *move.step()->changes.front().inNew; }
+    static const FrameSpan& rangeOf(const NoteEntry& move) { return *move.step()->changes.front().inNew; }
     static std::string idOf(const NoteEntry& entry) { return concatenated({"s", std::to_string(entry.number)}); }
     static std::string keptId(std::size_t reel, std::size_t kept)
     {
@@ -209,8 +209,8 @@ private:
 
     void drawKept(const core::KeptStretch& kept, const std::string& kind, const std::string& id)
     {
-        const FrameRange inOld{kept.oldStart, kept.length};
-        const FrameRange inNew{kept.newStart, kept.length};
+        const FrameSpan inOld{kept.oldStart, kept.length};
+        const FrameSpan inNew{kept.newStart, kept.length};
         const std::string boxKind = kind == "moved" ? "moved" : "seen";
         m_sink(box(inOld, true, boxKind, id, {}) + box(inNew, false, boxKind, id, {}) + band(inOld, inNew, kind, id));
     }
@@ -219,7 +219,7 @@ private:
     {
         const NoteStep& step = *entry.step();
         const std::string title = m_words.action(entry);
-        for (const FrameRange& removed : step.removedFrames)
+        for (const FrameSpan& removed : step.removedFrames)
             m_sink(box(removed, true, "lifted", idOf(entry), title));
         if (step.action == core::StepAction::Replace && step.inserted.length > 0)
             m_sink(box(step.inserted, false, "inserted", idOf(entry), title));
@@ -229,7 +229,7 @@ private:
         }
     }
 
-    static std::string box(const FrameRange& frames, bool isOld, const std::string& kind, const std::string& id,
+    static std::string box(const FrameSpan& frames, bool isOld, const std::string& kind, const std::string& id,
                            const std::string& title)
     {
         return "<rect class=\"" + kind + "\" x=\"" + std::to_string(frames.start) + "\" y=\"" +
@@ -243,7 +243,7 @@ private:
         return id.empty() ? "" : concatenated({" data-step=\"", id, "\""});
     }
 
-    static std::string band(const FrameRange& inOld, const FrameRange& inNew, const std::string& kind,
+    static std::string band(const FrameSpan& inOld, const FrameSpan& inNew, const std::string& kind,
                             const std::string& id)
     {
         const auto point = [](std::int32_t x, int y) { return std::to_string(x) + " " + std::to_string(y); };

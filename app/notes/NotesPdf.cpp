@@ -15,7 +15,7 @@
 
 namespace cadrel::app {
 
-using core::FrameRange;
+using core::FrameSpan;
 using core::NoteEntry;
 using core::PictureChange;
 
@@ -112,13 +112,13 @@ private:
         return Margin + (m_right - Margin) * frame / longest;
     }
 
-    void drawBox(const FrameRange& frames, double top, const PdfColour& colour)
+    void drawBox(const FrameSpan& frames, double top, const PdfColour& colour)
     {
         const double left = xOf(frames.start);
         m_pages.box(left, top, std::max(0.3, xOf(frames.end()) - left), StripHeight, colour);
     }
 
-    void drawBand(const FrameRange& inOld, const FrameRange& inNew, double top, const PdfColour& colour)
+    void drawBand(const FrameSpan& inOld, const FrameSpan& inNew, double top, const PdfColour& colour)
     {
         m_pages.band(xOf(inOld.start), xOf(inOld.end()), top, xOf(inNew.start), xOf(inNew.end()), top + BandHeight,
                      colour);
@@ -133,15 +133,14 @@ private:
         m_pages.text(Margin, newTop + StripHeight + 10, "new cut", SmallFont, Dim);
         drawBox({0, m_document.notes.oldCut().length()}, oldTop, Kept);
         drawBox({0, m_document.notes.newCut().length()}, newTop, Kept);
-        std::vector<FrameRange> moves;
+        std::vector<FrameSpan> moves;
         for (const core::ReelNotes& reel : m_document.notes.reels()) {
             for (const NoteEntry& entry : reel.entries) {
                 if (entry.step() != nullptr && entry.step()->action == core::StepAction::Move)
                     moves.push_back(*entry.step()->changes.front().inNew);
             }
         }
-        std::sort(moves.begin(), moves.end(),
-                  [](const FrameRange& a, const FrameRange& b) { return a.start < b.start; });
+        std::sort(moves.begin(), moves.end(), [](const FrameSpan& a, const FrameSpan& b) { return a.start < b.start; });
         for (const bool drawsMoves : {false, true}) {
             for (const core::ReelNotes& reel : m_document.notes.reels()) {
                 for (const NoteEntry& entry : reel.entries)
@@ -150,14 +149,14 @@ private:
         }
     }
 
-    void drawEntry(const NoteEntry& entry, const std::vector<FrameRange>& moves, bool drawsMoves, double oldTop,
+    void drawEntry(const NoteEntry& entry, const std::vector<FrameSpan>& moves, bool drawsMoves, double oldTop,
                    double newTop)
     {
         const double bandTop = oldTop + StripHeight;
         if (const core::KeptStretch* const kept = entry.kept()) {
             const auto after =
                 std::upper_bound(moves.begin(), moves.end(), kept->newStart,
-                                 [](std::int32_t frame, const FrameRange& move) { return frame < move.start; });
+                                 [](std::int32_t frame, const FrameSpan& move) { return frame < move.start; });
             const bool isMoved = after != moves.begin() && kept->newStart < (after - 1)->end();
             if (isMoved == drawsMoves)
                 drawBand({kept->oldStart, kept->length}, {kept->newStart, kept->length}, bandTop,
@@ -167,7 +166,7 @@ private:
         const core::NoteStep& step = *entry.step();
         if (!drawsMoves || step.action != core::StepAction::Replace)
             return;
-        for (const FrameRange& removed : step.removedFrames)
+        for (const FrameSpan& removed : step.removedFrames)
             drawBox(removed, oldTop, Lifted);
         if (step.inserted.length > 0)
             drawBox(step.inserted, newTop, Inserted);

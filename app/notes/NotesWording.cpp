@@ -256,7 +256,7 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
 std::string NotesWording::reelTitle(std::size_t reel) const
 {
     const auto& notes = m_document.notes;
-    const core::ReelPair& pair = notes.reels()[reel].pair;
+    const core::ReelChange& pair = notes.reels()[reel].pair;
     std::string title = "Reel " + std::to_string(reel + 1) + ", ";
     if (!pair.newReel)
         return title + timecode(notes.oldCut().reels()[*pair.oldReel].timecodeStart) + ", is gone";

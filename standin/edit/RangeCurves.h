@@ -19,7 +19,7 @@ class Envelope;
 //                 __/  |         __/|            An outer point may be one that stood at the edge before. At the
 //              __/     |    ____/   |            start it lies in the range that is replaced and goes like all
 //           __/        o___/        o_____       points there, unless it is needed; at the end it lies outside,
-//                     inner        outer         and stays whatever it is worth.
+//                     inner        outer         and is always kept.
 //                 start            end
 //
 // Where at most one point would be left, which may be far away, the first of those in the range that had its value stays

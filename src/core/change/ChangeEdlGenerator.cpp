@@ -19,7 +19,7 @@ using util::Result;
 
 namespace {
 
-/// A copy of a list, behind whose events stand the transitions as events of their own. It knows which event of the list
+/// A copy of a list in which the transitions are events of their own, after all others. It knows which event of the list
 /// each of them comes from.
 class WorkingList {
 public:

@@ -13,7 +13,8 @@ class CutEventBase {
 public:
     virtual ~CutEventBase() = default;
 
-    /// The host events and the automation around a time on this event's track.
+    /// Answers what lies across an instant of this event's track, before it and after it, and the automation there. It
+    /// changes nothing.
     virtual CutEventSpans update(double time) = 0;
     virtual std::wstring getTrackName() = 0;
     virtual bool isAudio() = 0;

@@ -12,8 +12,8 @@
 
 namespace cadrel::core {
 
-/// A track of markers in the project: that of a kind of spots, that of the stretches which were carried over, or that of the
-/// user's memos. A new kind of spot is a MarkerKind and a line of the table below.
+/// A marker track of the project: for one kind of marker, for the stretches that were carried over, or for the user's
+/// memos. A new kind is a MarkerKind and a line of the table below.
 struct MarkerTrack {
     std::int32_t kind;               ///< of the entries that are written there, a MarkerKind; NoKind where none is
     std::int32_t role;               ///< the number that is stored with the track

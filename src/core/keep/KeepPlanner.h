@@ -31,7 +31,7 @@ struct KeepContext {
     bool isForced = false;
 };
 
-/// Finds what a run has to do so that nothing moves that the new cut doesn't speak of. A change EDL says which picture
+/// Plans a run that leaves alone everything that the recut didn't change. A change EDL says which picture
 /// survives; a run of it takes everything else away, leader, pops, tails and other reels too. A plan holds more:
 ///
 ///     1 the picture of each cut, frame by frame

@@ -101,7 +101,7 @@ std::size_t ChangeNotes::joinedSteps() const
 
 std::int32_t ChangeNotes::timecodeOf(const WorkPlace& place) const
 {
-    const ReelPair& pair = m_reels[place.reel].pair;
+    const ReelChange& pair = m_reels[place.reel].pair;
     const Reel& reel = pair.newReel ? m_newCut.reels()[*pair.newReel] : m_oldCut.reels()[*pair.oldReel];
     return reel.timecodeStart + place.frame;
 }

@@ -37,7 +37,7 @@ struct NoteEntry {
 };
 
 struct ReelNotes {
-    ReelPair pair;
+    ReelChange pair;
     std::int32_t before = 0;
     std::int32_t after = 0;
     std::vector<NoteEntry> entries;

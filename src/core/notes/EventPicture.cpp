@@ -77,7 +77,7 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Pic
                                                                   event.dstIn().toFrameCount(rules.framerate));
 }
 
-PictureRun EventPicture::runFrom(std::int32_t from) const
+ShownRun EventPicture::runFrom(std::int32_t from) const
 {
     const bool isTransition = from < transitionLength();
     const Material& material = isTransition ? *m_transition : m_body;

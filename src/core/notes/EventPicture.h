@@ -16,7 +16,7 @@ public:
     std::int32_t transitionLength() const { return m_transition ? m_transitionLength : 0; }
     /// What is seen of the transition, or of the rest, from the frame `from` of the event. `start` and `length` are left
     /// to the caller.
-    PictureRun runFrom(std::int32_t from) const;
+    ShownRun runFrom(std::int32_t from) const;
 
 private:
     struct Material {

@@ -15,12 +15,12 @@ namespace cadrel::core {
 class EventBase;
 
 /// Frames of a programme: `length` of them from `start`.
-struct FrameRange {
+struct FrameSpan {
     std::int32_t start = 0;
     std::int32_t length = 0;
 
     std::int32_t end() const { return start + length; }
-    bool operator==(const FrameRange&) const = default;
+    bool operator==(const FrameSpan&) const = default;
 };
 
 /// What happens to the picture.
@@ -44,8 +44,8 @@ struct PictureChange {
     std::int32_t frames = 0;            ///< of a trim, signed by what the shot wins; else how long the picture is now
     const EventBase* oldShot = nullptr; ///< in the old cut; null where there is none
     const EventBase* newShot = nullptr; ///< in the new cut; null where there is none
-    std::optional<FrameRange> inOld;    ///< where it stood, in the frames of the old programme
-    std::optional<FrameRange> inNew;    ///< where it stands
+    std::optional<FrameSpan> inOld;     ///< where it stood, in the frames of the old programme
+    std::optional<FrameSpan> inNew;     ///< where it stands
     std::int32_t shots = 1;             ///< of a move: how many shots
     bool isPart = false;                ///< of a lift: the rest of the shot stays somewhere
 };
@@ -69,9 +69,9 @@ enum class StepAction {
 struct NoteStep {
     StepAction action = StepAction::Replace;
     WorkPlace place;
-    std::int32_t removed = 0;              ///< frames
-    std::vector<FrameRange> removedFrames; ///< the same in the old programme
-    FrameRange inserted;                   ///< in the new programme
+    std::int32_t removed = 0;             ///< frames
+    std::vector<FrameSpan> removedFrames; ///< the same in the old programme
+    FrameSpan inserted;                   ///< in the new programme
     WorkPlace from;
     std::int32_t moved = 0;             ///< frames
     std::vector<WorkPlace> doubledFrom; ///< of each change of the kind Doubled, where the picture is as well
@@ -87,7 +87,7 @@ struct NoteStep {
 using NoteRow = std::variant<KeptStretch, NoteStep>;
 
 /// A reel of the old cut with that which it has become. One of them is missing where a reel is new or gone.
-struct ReelPair {
+struct ReelChange {
     std::optional<std::size_t> oldReel;
     std::optional<std::size_t> newReel;
 };

@@ -119,7 +119,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
     const std::int32_t gapMaterial = numbers.numberOf("gap");
     const std::int32_t gapBetweenReels = SecondsBetweenReels * rules.framerate.framesPerSecond;
 
-    const auto append = [this](PictureRun run, std::int32_t runLength) {
+    const auto append = [this](ShownRun run, std::int32_t runLength) {
         run.start = length();
         run.length = runLength;
         m_runs.push_back(run);
@@ -131,7 +131,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
         if (m_reels.empty() || gap >= gapBetweenReels)
             m_reels.push_back({stretch.in, length(), 0});
         else if (gap > 0)
-            append({0, 0, gapMaterial, gapMaterial, 0.0, 1.0, PictureRun::NoEvent, false}, gap);
+            append({0, 0, gapMaterial, gapMaterial, 0.0, 1.0, ShownRun::NoEvent, false}, gap);
         const EventBase& event = events.at(static_cast<std::size_t>(stretch.event));
         const EventPicture picture(events, static_cast<std::size_t>(stretch.event), rules, numbers);
         const std::int32_t dstIn = event.dstIn().toFrameCount(rules.framerate);
@@ -149,7 +149,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
 std::size_t Programme::runAt(std::int32_t frame) const
 {
     const auto after = std::upper_bound(m_runs.begin(), m_runs.end(), frame,
-                                        [](std::int32_t value, const PictureRun& run) { return value < run.start; });
+                                        [](std::int32_t value, const ShownRun& run) { return value < run.start; });
     return static_cast<std::size_t>(after - m_runs.begin()) - 1;
 }
 
@@ -165,7 +165,7 @@ std::int32_t Programme::timecodeOf(std::int32_t frame, std::size_t reel) const
     return m_reels[reel].timecodeStart + frame - m_reels[reel].start;
 }
 
-const EventBase* Programme::eventOf(const PictureRun& run) const
+const EventBase* Programme::eventOf(const ShownRun& run) const
 {
     return run.isGap() ? nullptr : &m_events->at(static_cast<std::size_t>(run.event));
 }

@@ -18,7 +18,7 @@ class EventList;
 ///
 /// Frame i of a run shows frame `source` + i x `sourceStep` of its material. Two frames are the same picture when their
 /// material is the same, the steps are the same speed, and they show the same frame.
-struct PictureRun {
+struct ShownRun {
     static constexpr std::int32_t NoEvent = -1;
 
     std::int32_t start;    ///< in the frames of the programme
@@ -73,7 +73,7 @@ public:
 
     const EventList& events() const { return *m_events; }
     /// In order, without a frame between two runs.
-    const std::vector<PictureRun>& runs() const { return m_runs; }
+    const std::vector<ShownRun>& runs() const { return m_runs; }
     const std::vector<Reel>& reels() const { return m_reels; }
     const std::vector<DoubtfulEvent>& doubts() const { return m_doubts; }
     std::int32_t length() const { return m_runs.empty() ? 0 : m_runs.back().end(); }
@@ -84,11 +84,11 @@ public:
     /// The frame count of a frame's timecode. The end of a reel is taken for the frame after its last.
     std::int32_t timecodeOf(std::int32_t frame, std::size_t reel) const;
     /// Null for a gap.
-    const EventBase* eventOf(const PictureRun& run) const;
+    const EventBase* eventOf(const ShownRun& run) const;
 
 private:
     const EventList* m_events;
-    std::vector<PictureRun> m_runs;
+    std::vector<ShownRun> m_runs;
     std::vector<Reel> m_reels;
     std::vector<DoubtfulEvent> m_doubts;
 };

@@ -17,7 +17,7 @@ namespace {
 constexpr std::size_t MostLookedAt = 128;
 constexpr std::size_t MostFound = 16;
 
-std::optional<SharedPicture> share(const PictureRun& oldRun, std::size_t oldIndex, const PictureRun& newRun,
+std::optional<SharedPicture> share(const ShownRun& oldRun, std::size_t oldIndex, const ShownRun& newRun,
                                    std::size_t newIndex)
 {
     if (!EventBase::areSameSpeed(oldRun.sourceStep, newRun.sourceStep))
@@ -32,7 +32,7 @@ std::optional<SharedPicture> share(const PictureRun& oldRun, std::size_t oldInde
                          oldIndex, newIndex};
 }
 
-double sourceTaken(const PictureRun& run)
+double sourceTaken(const ShownRun& run)
 {
     return run.length * std::abs(run.sourceStep);
 }
@@ -54,7 +54,7 @@ SharedPictureSearch::SharedPictureSearch(const Programme& oldCut) : m_oldCut(old
     }
 }
 
-std::vector<SharedPicture> SharedPictureSearch::sharedWith(const PictureRun& newRun, std::size_t newIndex) const
+std::vector<SharedPicture> SharedPictureSearch::sharedWith(const ShownRun& newRun, std::size_t newIndex) const
 {
     std::vector<SharedPicture> found;
     const auto entry = m_materials.find(newRun.material);

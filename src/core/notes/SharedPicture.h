@@ -30,7 +30,7 @@ public:
     explicit SharedPictureSearch(const Programme& oldCut);
 
     /// What a run shares with old runs, at most a few dozen, in the order of the new programme.
-    std::vector<SharedPicture> sharedWith(const PictureRun& newRun, std::size_t newIndex) const;
+    std::vector<SharedPicture> sharedWith(const ShownRun& newRun, std::size_t newIndex) const;
 
 private:
     struct Material {

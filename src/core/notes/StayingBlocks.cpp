@@ -86,7 +86,8 @@ void letStay(std::vector<KeptBlock>& blocks, const std::vector<std::size_t>& can
 
 } // namespace
 
-std::vector<ReelPair> pairReels(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept)
+std::vector<ReelChange> pairReels(const Programme& oldCut, const Programme& newCut,
+                                  const std::vector<KeptStretch>& kept)
 {
     std::map<std::pair<std::size_t, std::size_t>, std::int32_t> common;
     for (const KeptStretch& stretch : kept)
@@ -96,7 +97,7 @@ std::vector<ReelPair> pairReels(const Programme& oldCut, const Programme& newCut
         offers.emplace_back(-frames, reels.first, reels.second);
     std::sort(offers.begin(), offers.end());
 
-    std::vector<ReelPair> pairs(newCut.reels().size());
+    std::vector<ReelChange> pairs(newCut.reels().size());
     std::vector<bool> isTaken(oldCut.reels().size(), false);
     for (const auto& [frames, newReel, oldReel] : offers) {
         if (pairs[newReel].oldReel || isTaken[oldReel])
@@ -121,7 +122,7 @@ std::vector<ReelPair> pairReels(const Programme& oldCut, const Programme& newCut
 }
 
 std::vector<KeptBlock> findBlocks(const Programme& oldCut, const Programme& newCut,
-                                  const std::vector<KeptStretch>& kept, const std::vector<ReelPair>& reels)
+                                  const std::vector<KeptStretch>& kept, const std::vector<ReelChange>& reels)
 {
     std::vector<KeptBlock> blocks = joinToBlocks(oldCut, newCut, kept);
     std::vector<std::vector<std::size_t>> candidates(newCut.reels().size());

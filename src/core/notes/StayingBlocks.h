@@ -15,7 +15,7 @@ class Programme;
 struct KeptBlock {
     std::size_t first;
     std::size_t last;
-    FrameRange inOld; ///< from its first to its last frame, with what is deleted between
+    FrameSpan inOld; ///< from its first to its last frame, with what is deleted between
     std::size_t oldReel;
     std::size_t newReel;
     bool stays = false; ///< else it has to be moved
@@ -23,12 +23,13 @@ struct KeptBlock {
 
 /// Brings together each new reel and the old one whose picture it has most of; reels without any common picture go
 /// together in their order. The new reels come first, in order, then old ones that are gone.
-std::vector<ReelPair> pairReels(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept);
+std::vector<ReelChange> pairReels(const Programme& oldCut, const Programme& newCut,
+                                  const std::vector<KeptStretch>& kept);
 
 /// The blocks in the order of the new programme. Within each pair of reels those stay that keep their order; it is the
 /// choice with the fewest moves, and of those the one that moves the fewest frames. `kept` are in the order of the new
 /// programme, none of them doubled.
 std::vector<KeptBlock> findBlocks(const Programme& oldCut, const Programme& newCut,
-                                  const std::vector<KeptStretch>& kept, const std::vector<ReelPair>& reels);
+                                  const std::vector<KeptStretch>& kept, const std::vector<ReelChange>& reels);
 
 } // namespace cadrel::core

@@ -16,15 +16,15 @@ namespace {
 
 /// The frames of one event among those that a step removes or inserts; of a gap, too.
 struct ShotPiece {
-    std::int32_t event = PictureRun::NoEvent;
-    FrameRange frames;
+    std::int32_t event = ShownRun::NoEvent;
+    FrameSpan frames;
     bool hasTransition = false;
     double source = 0.0;
     double sourceStep = 1.0;
     bool isTold = false; ///< as a part of another change
 };
 
-std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameRange& frames)
+std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameSpan& frames)
 {
     std::vector<ShotPiece> pieces;
     if (frames.length == 0)
@@ -32,7 +32,7 @@ std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameRange& fr
     const auto& runs = programme.runs();
     for (std::size_t index = programme.runAt(frames.start); index < runs.size() && runs[index].start < frames.end();
          ++index) {
-        const PictureRun& run = runs[index];
+        const ShownRun& run = runs[index];
         const std::int32_t start = std::max(run.start, frames.start);
         const std::int32_t length = std::min(run.end(), frames.end()) - start;
         if (!pieces.empty() && pieces.back().event == run.event) {
@@ -52,7 +52,7 @@ std::int32_t eventAt(const Programme& programme, std::int32_t frame)
 
 const EventBase* shotOf(const Programme& programme, std::int32_t event)
 {
-    return event == PictureRun::NoEvent ? nullptr : &programme.events().at(static_cast<std::size_t>(event));
+    return event == ShownRun::NoEvent ? nullptr : &programme.events().at(static_cast<std::size_t>(event));
 }
 
 /// The frames of a programme that an event is seen in around a frame of it.
@@ -71,8 +71,8 @@ struct Trim {
     std::int32_t fromTransition = 0; ///< what a transition of another length lets it win
     const EventBase* oldShot = nullptr;
     const EventBase* newShot = nullptr;
-    std::optional<FrameRange> inOld;
-    std::optional<FrameRange> inNew;
+    std::optional<FrameSpan> inOld;
+    std::optional<FrameSpan> inNew;
 
     std::int32_t change() const { return inserted - removed + fromTransition; }
 };
@@ -84,7 +84,7 @@ public:
                 const std::vector<KeptStretch>& doubled)
         : m_oldCut(oldCut), m_newCut(newCut), m_around(around)
     {
-        for (const FrameRange& frames : step.removedFrames) {
+        for (const FrameSpan& frames : step.removedFrames) {
             const auto pieces = piecesOf(oldCut, frames);
             m_old.insert(m_old.end(), pieces.begin(), pieces.end());
         }
@@ -114,7 +114,7 @@ public:
     }
 
 private:
-    void addNew(const FrameRange& frames)
+    void addNew(const FrameSpan& frames)
     {
         const auto pieces = piecesOf(m_newCut, frames);
         m_new.insert(m_new.end(), pieces.begin(), pieces.end());
@@ -123,7 +123,7 @@ private:
     bool isLastOf(const Programme& programme, const std::optional<KeptStretch>& before, std::int32_t end,
                   const ShotPiece& piece) const
     {
-        return before && piece.event != PictureRun::NoEvent && eventAt(programme, end - 1) == piece.event;
+        return before && piece.event != ShownRun::NoEvent && eventAt(programme, end - 1) == piece.event;
     }
 
     void findTrims()
@@ -135,7 +135,7 @@ private:
             addInserted(m_tail, m_new.front());
         if (!m_new.empty() && !m_new.back().isTold && m_around.afterInNew &&
             m_new.back().event == eventAt(m_newCut, m_around.afterInNew->newStart) &&
-            m_new.back().event != PictureRun::NoEvent && m_new.back().frames.end() == m_around.afterInNew->newStart)
+            m_new.back().event != ShownRun::NoEvent && m_new.back().frames.end() == m_around.afterInNew->newStart)
             addInserted(m_head, m_new.back());
     }
 
@@ -148,7 +148,7 @@ private:
                                     isLastOf(m_oldCut, m_around.beforeInOld, m_around.beforeInOld->oldEnd(), first);
         ShotPiece& last = m_old.back();
         const bool beginsShotAfter = m_around.afterInOld && m_around.afterInOld->oldStart == last.frames.end() &&
-                                     last.event != PictureRun::NoEvent &&
+                                     last.event != ShownRun::NoEvent &&
                                      eventAt(m_oldCut, m_around.afterInOld->oldStart) == last.event;
         if (&first == &last && endsShotBefore && beginsShotAfter)
             return; // a part out of the middle of a shot
@@ -276,10 +276,10 @@ private:
     {
         auto from = m_old.begin();
         for (ShotPiece& newPiece : m_new) {
-            if (newPiece.isTold || newPiece.event == PictureRun::NoEvent)
+            if (newPiece.isTold || newPiece.event == ShownRun::NoEvent)
                 continue;
             const auto found = std::find_if(from, m_old.end(), [&](const ShotPiece& oldPiece) {
-                return !oldPiece.isTold && oldPiece.event != PictureRun::NoEvent && belong(oldPiece, newPiece);
+                return !oldPiece.isTold && oldPiece.event != ShownRun::NoEvent && belong(oldPiece, newPiece);
             });
             if (found == m_old.end())
                 continue;
@@ -385,7 +385,7 @@ std::vector<PictureChange> StepChanges::ofReplacing(const NoteStep& step, const 
     return Description(m_oldCut, m_newCut, step, around, doubled).make();
 }
 
-PictureChange StepChanges::ofMoving(FrameRange inOld, FrameRange inNew) const
+PictureChange StepChanges::ofMoving(FrameSpan inOld, FrameSpan inNew) const
 {
     PictureChange change;
     change.kind = ChangeKind::Moved;

@@ -26,7 +26,7 @@ public:
     /// `doubled` are the doubled stretches among the inserted frames.
     std::vector<PictureChange> ofReplacing(const NoteStep& step, const StepSurroundings& around,
                                            const std::vector<KeptStretch>& doubled) const;
-    PictureChange ofMoving(FrameRange inOld, FrameRange inNew) const;
+    PictureChange ofMoving(FrameSpan inOld, FrameSpan inNew) const;
     /// A change for each shot of a kept stretch that bears another version than before.
     std::vector<PictureChange> ofVersions(const KeptStretch& kept) const;
 

@@ -29,7 +29,7 @@ struct Slot {
 
     Kind kind;
     std::size_t reel;       ///< place in the list of pairs
-    FrameRange frames;      ///< of the old programme, or the new one for Inserted
+    FrameSpan frames;       ///< of the old programme, or the new one for Inserted
     std::size_t index = 0;  ///< of the block for Origin and Block, of the kept stretch for Kept
     bool isInBlock = false; ///< frames that go from within a block
 };
@@ -81,7 +81,7 @@ private:
             m_isInPlace[block] = m_blocks[block].stays;
     }
 
-    void addSlot(Slot::Kind kind, std::size_t reel, FrameRange frames, std::size_t index = 0, bool isInBlock = false)
+    void addSlot(Slot::Kind kind, std::size_t reel, FrameSpan frames, std::size_t index = 0, bool isInBlock = false)
     {
         m_slots.push_back({kind, reel, frames, index, isInBlock});
     }
@@ -89,7 +89,7 @@ private:
     void addSlots(std::size_t reel)
     {
         m_firstSlots.push_back(m_slots.size());
-        const ReelPair& pair = m_list.reels[reel];
+        const ReelChange& pair = m_list.reels[reel];
         OldWalk walk = walkOf(pair);
         if (pair.newReel)
             addNewReel(*pair.newReel, reel, walk);
@@ -105,7 +105,7 @@ private:
         std::size_t next = 0; ///< kept stretch in the order of the old programme
     };
 
-    OldWalk walkOf(const ReelPair& pair) const
+    OldWalk walkOf(const ReelChange& pair) const
     {
         if (!pair.oldReel)
             return {};
@@ -301,7 +301,7 @@ private:
         NoteStep step;
         step.place = placeOf(m_waiting.front());
         for (const std::size_t slot : m_waiting) {
-            const FrameRange& frames = m_slots[slot].frames;
+            const FrameSpan& frames = m_slots[slot].frames;
             if (m_slots[slot].kind == Slot::Kind::Inserted) {
                 step.inserted = frames;
             } else {
@@ -345,7 +345,7 @@ private:
         return *(after - 1);
     }
 
-    std::vector<KeptStretch> doubledIn(const FrameRange& inserted) const
+    std::vector<KeptStretch> doubledIn(const FrameSpan& inserted) const
     {
         const auto first = std::partition_point(m_doubled.begin(), m_doubled.end(), [&](const KeptStretch& stretch) {
             return stretch.newStart < inserted.start;

@@ -11,7 +11,7 @@ namespace cadrel::core {
 
 /// The way from the old to the new cut.
 struct StepList {
-    std::vector<ReelPair> reels;
+    std::vector<ReelChange> reels;
     std::vector<std::vector<NoteRow>> rows; ///< of each pair of reels
 };
 

@@ -42,7 +42,7 @@ public:
     /// The context outlives this object.
     explicit MemoSync(Velmark::IHostContext* context) : m_hostContext(context) {}
 
-    /// Carries over what has become of the copies since they were remembered or, where they weren't, whatever differs.
+    /// Applies the edits of the copies to their memos. A copy that wasn't remembered is compared with its memo.
     /// Throws Result::HostObjectMissing and Result::HostCallFailed.
     void follow(const Track& memos, const Previewed& previewed, Velmark::IEditTransaction& transaction);
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.

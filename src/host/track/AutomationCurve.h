@@ -31,9 +31,9 @@ public:
     /// The points on both sides of a time; after the last one the curve keeps its value.
     core::AutomationState stateAt(double time) const;
 
-    /// Lets the curve run straight from what it has come to at `start` to what it goes on with at `end`: a new point at
-    /// either takes the place of all that stood from the one to the other. Does nothing to a curve without points, and
-    /// for an end before the start.
+    /// Lets the curve run straight from its value at `start` to its value at `end`. All points from `start` to `end` are
+    /// replaced by one new point at each of them. Does nothing to a curve without points, and for an end before the
+    /// start.
     ///
     ///     before   --\  .--.  /--          after   --.        /--
     ///                 \_|  |_/                        `-.____/

@@ -23,8 +23,8 @@ public:
     /// `events` in the order of the track.
     explicit TrackSpans(const std::vector<core::SecondsRange>& events);
 
-    /// The last one that ends before the time, the one across it, bounds included, and the first that starts after it;
-    /// of those that touch at the time the later is across. The automation is left empty. Throws
+    /// The last one that ends before the time, the one across it, bounds included, and the first that starts after it.
+    /// If two events touch at the time, the later one counts as across it. The automation is left empty. Throws
     /// Result::InvalidArgument when an event that is reversed or in no order comes before the first one after the time.
     core::CutEventSpans around(double time) const;
 

@@ -30,7 +30,7 @@ public:
     ~DataModelChangeCommand() override;
 
 private:
-    /// The one that the others come down to.
+    /// The other constructors call this one.
     DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction, core::DataModel& model,
                            Velmark::IProjectDocument* project, core::serialize::ByteArchive before, bool commitOnEnd);
 

@@ -27,7 +27,7 @@ public:
     MediaPool* mediaPool() const { return m_pool; }
     core::VideoList* videoList() const { return m_list; }
 
-    /// Which of two videos that meet isn't open here: the list has one from the very frame at which it starts.
+    /// `lastFrame` is ignored: where two videos meet, the second one counts from its first frame.
     VideoFrame getFrame(bool lastFrame, double time) override;
 
     void onChange(const core::ChangeContext& context) override;

@@ -30,8 +30,8 @@ public:
     /// How much later than in the list the videos are written, in seconds.
     void setOffset(double seconds) { m_offset = seconds; }
     /// Replaces what stands on the track by the videos of the list; does nothing for an empty one, nor on a track that the
-    /// user has locked. With an offset only what starts there or later is replaced, as the real programme isn't written. On
-    /// a track on which the user has put another video nothing is put in the place of what goes.
+    /// user has locked. With an offset only what starts there or later is replaced, because the real programme isn't
+    /// written. A track on which the user has put another video is only emptied.
     void writeVideoEvents(Velmark::IEditTransaction& transaction);
 
     void tracksChanged() override;

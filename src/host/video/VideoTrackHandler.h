@@ -14,9 +14,9 @@
 
 namespace cadrel::host {
 
-/// The channels over the video tracks of a project. What a track carries is kept in its role. Of a track without one nobody
-/// knows: it is never that of the new picture, on which runs write; but the old picture is looked for on the first channel
-/// where no track has its role.
+/// The channels over the video tracks of a project. What a track carries is kept in its role. A track without a
+/// role is never that of the new picture, on which runs write. If no track has the role of the old picture, the first
+/// channel counts as the old picture.
 class VideoTrackHandler : public gui::VideoTrackHandlerBase, public ProjectListener {
 public:
     static constexpr std::size_t ChannelCount = 2;

@@ -15,10 +15,10 @@ namespace cadrel::tests {
 using core::EventBase;
 using core::EventFlaw;
 using core::EventList;
-using core::FrameRange;
+using core::FrameSpan;
 using core::NoteStep;
 using core::PictureRules;
-using core::ReelPair;
+using core::ReelChange;
 using core::StepAction;
 
 namespace {
@@ -100,12 +100,12 @@ std::vector<std::vector<SeenFrame>> framesOf(const EventList& events, const Pict
 }
 
 NotesPlayer::NotesPlayer(const EventList& oldCut, const EventList& newCut, const PictureRules& rules,
-                         const std::vector<ReelPair>& reels)
+                         const std::vector<ReelChange>& reels)
 {
     const auto oldReels = framesOf(oldCut, rules);
     const auto newReels = framesOf(newCut, rules);
     std::vector<int> used(oldReels.size(), 0);
-    for (const ReelPair& pair : reels) {
+    for (const ReelChange& pair : reels) {
         m_reels.push_back(pair.oldReel ? oldReels.at(*pair.oldReel) : std::vector<SeenFrame>());
         m_goal.push_back(pair.newReel ? newReels.at(*pair.newReel) : std::vector<SeenFrame>());
         if (pair.oldReel)

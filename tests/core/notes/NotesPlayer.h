@@ -30,7 +30,7 @@ std::vector<std::vector<SeenFrame>> framesOf(const core::EventList& events, cons
 class NotesPlayer {
 public:
     NotesPlayer(const core::EventList& oldCut, const core::EventList& newCut, const core::PictureRules& rules,
-                const std::vector<core::ReelPair>& reels);
+                const std::vector<core::ReelChange>& reels);
 
     void carryOut(const core::NoteStep& step);
     /// Empty when all reels are as in the new cut, else where they differ first.
