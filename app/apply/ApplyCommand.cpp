@@ -369,6 +369,7 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     HostedProject hosted(options.projectFile, terminal);
     const ProjectClock clock = clockOf(hosted.project(), options.projectFile);
     requireRate(options, clock);
+    hosted.endPreview();
     configure(hosted.model().settings(), options.generation.settings);
     restrictRange(hosted.model().settings(), options.generation.settings.preserve);
     Preparation run(hosted, clock, options, terminal);

@@ -10,6 +10,7 @@
 #include "tests/support/core/TreeEdls.h"
 #include "tests/support/standin/RandomProject.h"
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <cstdio>
@@ -315,6 +316,90 @@ TEST(Keep, BeforeOneChangeNothingMovesAndAfterItEverythingByTheSame)
         EXPECT_EQ(notes["events"][0], trackIn(job.project, "Notes")["events"][0]);
         EXPECT_NEAR(notes["events"][1].at("start").get<double>(), film + 18, 1.0 / 384000);
     }
+}
+
+/// The tracks of a project whose content a run may change, those in folders too; without those that runs write on.
+std::vector<json> changeableTracks(const json& tracks)
+{
+    std::vector<json> found;
+    for (const json& track : tracks) {
+        if (track.at("kind") == "folder") {
+            for (const json& inner : changeableTracks(track.value("tracks", json::array())))
+                found.push_back(inner);
+        } else if (track.at("kind") != "ruler" && track.value("name", std::string()) != "Destination" &&
+                   track.value("name", std::string()) != "Insert") {
+            found.push_back(track);
+        }
+    }
+    return found;
+}
+
+double endOf(const json& event)
+{
+    return event.value("end", event.at("start").get<double>());
+}
+
+/// Whether a list holds the event, as much later as `shift`; 0 means to the last bit.
+bool holds(const json& events, const json& event, double shift)
+{
+    const auto isSame = [&](const json& other) {
+        if (shift == 0.0)
+            return other == event;
+        json moved = other;
+        moved["start"] = event.at("start");
+        if (event.contains("end"))
+            moved["end"] = event.at("end");
+        constexpr double SameInstant = 1.0 / 384000;
+        return moved == event &&
+               std::abs(other.at("start").get<double>() - event.at("start").get<double>() - shift) < SameInstant &&
+               std::abs(endOf(other) - endOf(event) - shift) < SameInstant;
+    };
+    return std::any_of(events.begin(), events.end(), isSame);
+}
+
+TEST(Keep, InRandomProjectsOneChangeLeavesWhatIsBeforeItAndShiftsWhatIsAfter)
+{
+    constexpr double Change = 40;
+    constexpr double Added = 4;
+    const Reel before = Reel(Hour).shot("A", 100, Change).shot("B", 1000, 200);
+    const Reel after = Reel(Hour).shot("A", 100, Change).shot("N", 50, Added).shot("B", 1000, 200);
+    std::size_t stayed = 0;
+    std::size_t moved = 0;
+    for (std::uint64_t seed = 200; seed < 320; ++seed) {
+        SCOPED_TRACE(seed);
+        const Job job(before, after, json::array());
+        json project = json::parse(randomText(seed, cadrel::core::Framerate(24, 0)));
+        project["timeOrigin"] = Hour;
+        writeFile(job.project, project.dump());
+
+        const Outcome outcome = job.run({"--force"});
+
+        if (tells(outcome.err, "has no tracks that a run could change"))
+            continue;
+        ASSERT_EQ(outcome.status, 0) << outcome.err;
+        const std::vector<json> tracksBefore = changeableTracks(tracksIn(job.project));
+        const std::vector<json> tracksAfter = changeableTracks(tracksIn(job.result));
+        ASSERT_GE(tracksAfter.size(), tracksBefore.size());
+        for (std::size_t index = 0; index < tracksBefore.size(); ++index) {
+            const json& was = tracksBefore[index];
+            const json now = tracksAfter[index].value("events", json::array());
+            if (was.value("locked", false)) {
+                EXPECT_EQ(tracksAfter[index], was);
+                continue;
+            }
+            for (const json& event : was.value("events", json::array())) {
+                if (endOf(event) < Change) {
+                    EXPECT_TRUE(holds(now, event, 0.0)) << event;
+                    ++stayed;
+                } else if (event.at("start").get<double>() > Change) {
+                    EXPECT_TRUE(holds(now, event, Added)) << event;
+                    ++moved;
+                }
+            }
+        }
+    }
+    EXPECT_GT(stayed, 100U);
+    EXPECT_GT(moved, 100U);
 }
 
 TEST(Keep, PopAndTailFollowTheirOwnReelAndOtherReelsStay)
