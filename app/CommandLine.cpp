@@ -26,6 +26,7 @@ namespace {
 constexpr const char* MainHelp = R"(Examples:
   cadrel generate --old reel3_v07.edl --new reel3_v12.edl -o reel3_change.edl
   cadrel apply reel3.stage --old reel3_v07.edl --new reel3_v12.edl -o reel3_v12.stage
+  cadrel notes --old reel3_v07.edl --new reel3_v12.edl -o reel3_notes.html
   cadrel list reel3_v12.edl
   cadrel show reel3.stage
 
@@ -62,6 +63,19 @@ Examples:
   cadrel apply reel3.stage --change reel3_change.edl --in-place
   cadrel apply reel3.stage --old old.edl --new new.edl --tracks selected --overhang 6 --no-destination-markers \
       --preserve 03:02:00:00 03:05:00:00 -o scene42.stage --json report.json)";
+
+constexpr const char* NotesHelp =
+    R"(Says in programme order what has changed: what was trimmed, lifted, inserted, replaced, moved, doubled or retimed, new
+versions of VFX shots, other dissolves and wipes. The lines are steps. Carried out in order by hand, they turn the
+old cut into the new one: each stands at its place in the programme as it is then, and all before it is done.
+
+The name of the file tells the form: .html with a picture of both cuts, .pdf for paper, .csv with a row for each step,
+.txt, .json.
+Without -o the text goes to standard output.
+
+Examples:
+  cadrel notes --old reel3_v07.edl --new reel3_v12.edl --vfx 'VFX_****_v,_comp' -o notes.html
+  cadrel notes --old old.edl --new new.edl --simplify 48 --feet)";
 
 constexpr const char* ListHelp =
     R"(Each event is "ok", or its state says which kind of flaw it has: "format" for a field that can't be read,
@@ -259,6 +273,15 @@ CLI::Option* addSetting(CLI::App& command, GivenSettings& given, const SettingEn
     return std::visit(SettingAdder(command, given, entry), entry.kind);
 }
 
+/// The settings that say how a change EDL is made.
+void addMatching(CLI::App& command, GivenSettings& given)
+{
+    for (const SettingEntry& entry : settingsTable()) {
+        if (entry.use != SettingEntry::Use::Run)
+            addSetting(command, given, entry);
+    }
+}
+
 CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
 {
     CLI::App* const generate = program.add_subcommand("generate", "Make the change EDL from an old and a new cut");
@@ -266,10 +289,7 @@ CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
     addFiles(*generate, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
     addOutput(*generate, "-o,--output", options.changeFile, "Where to write the change EDL");
     addOutput(*generate, "--json", options.jsonFile, EventsJsonHelp);
-    for (const SettingEntry& entry : settingsTable()) {
-        if (entry.use != SettingEntry::Use::Run)
-            addSetting(*generate, options.generation.settings, entry);
-    }
+    addMatching(*generate, options.generation.settings);
     addShift(*generate, options.generation.shifts);
     addLoadOptions(*generate, options.generation.load);
     generate->footer(GenerateHelp);
@@ -316,6 +336,31 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
     return apply;
 }
 
+CLI::App* addNotes(CLI::App& program, NotesOptions& options)
+{
+    CLI::App* const notes = program.add_subcommand("notes", "Tell what has changed between two cuts, step by step");
+    addFiles(*notes, "--old", options.generation.oldFiles, "EDLs of the old cut, in order")->required();
+    addFiles(*notes, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
+    addOutput(*notes, "-o,--output", options.outputFile, "Where to write the notes: .html, .pdf, .csv, .txt or .json");
+    notes
+        ->add_option("--simplify", options.simplify,
+                     "Join trims that cancel out within so many frames into one step (default 0, none)")
+        ->check(CLI::Range(0, 10000))
+        ->type_name("FRAMES");
+    notes->add_flag("--feet", options.showsFeet, "Show places also in 35 mm feet and frames, 16 frames a foot");
+    notes
+        ->add_option_function<std::string>(
+            "--paper", [&options](const std::string& size) { options.isLetter = size == "letter"; },
+            "The paper of a PDF: a4 (default) or letter")
+        ->check(CLI::IsMember({"a4", "letter"}))
+        ->type_name("SIZE");
+    addMatching(*notes, options.generation.settings);
+    addShift(*notes, options.generation.shifts);
+    addLoadOptions(*notes, options.generation.load);
+    notes->footer(NotesHelp);
+    return notes;
+}
+
 CLI::App* addList(CLI::App& program, ListOptions& options)
 {
     CLI::App* const list = program.add_subcommand("list", "Show the events of EDLs and what is wrong with them");
@@ -353,6 +398,7 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
     program.footer(MainHelp);
     addGenerate(program, line.generate);
     const CLI::App* const apply = addApply(program, line.apply);
+    const CLI::App* const notes = addNotes(program, line.notes);
     const CLI::App* const list = addList(program, line.list);
     const CLI::App* const show = addShow(program, line.show);
 
@@ -366,11 +412,13 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
         return std::nullopt;
     }
     if (program.get_subcommands().empty())
-        throw UsageError{"give a command, generate, apply, list or show"};
+        throw UsageError{"give a command, generate, apply, notes, list or show"};
     if (apply->parsed() && line.apply.changeFiles.empty() && line.apply.generation.oldFiles.empty())
         throw UsageError{"apply: give the two cuts with --old and --new, or a change EDL with --change"};
     if (apply->parsed())
         line.command = Command::Apply;
+    else if (notes->parsed())
+        line.command = Command::Notes;
     else if (list->parsed())
         line.command = Command::List;
     else if (show->parsed())

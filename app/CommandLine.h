@@ -5,6 +5,7 @@
 #include "app/apply/ApplyCommand.h"
 #include "app/edl/GenerateCommand.h"
 #include "app/edl/ListCommand.h"
+#include "app/notes/NotesCommand.h"
 #include "app/project/ShowCommand.h"
 
 #include <optional>
@@ -13,10 +14,11 @@ namespace cadrel::app {
 
 /// The command line, once parsed.
 struct CommandLine {
-    enum class Command { Generate, Apply, List, Show };
+    enum class Command { Generate, Apply, Notes, List, Show };
 
     GenerateOptions generate;
     ApplyOptions apply;
+    NotesOptions notes;
     ListOptions list;
     ShowOptions show;
     Command command = Command::Generate;

@@ -39,6 +39,9 @@ void run(int argc, char** argv, Terminal& terminal)
     case CommandLine::Command::Apply:
         app::runApply(line->apply, terminal);
         break;
+    case CommandLine::Command::Notes:
+        app::runNotes(line->notes, terminal);
+        break;
     case CommandLine::Command::List:
         app::runList(line->list, terminal);
         break;

@@ -3,7 +3,8 @@
 # needs. Does nothing where they are all there, and on systems other than Debian, where CMake says what it misses.
 set -eu
 
-needed="build-essential cmake libcli11-dev nlohmann-json3-dev libpugixml-dev juce-modules-source libgtest-dev librapidcheck-dev"
+needed="build-essential cmake libcli11-dev nlohmann-json3-dev libpugixml-dev juce-modules-source libgtest-dev librapidcheck-dev
+libcairo2-dev pkg-config"
 helpful="ninja-build ccache"
 case $1 in
 release) needed="$needed libbenchmark-dev" ;;

@@ -134,10 +134,10 @@ ChangeSource fillChangeList(DataModel& model, const ApplyOptions& options, Termi
     generation.load.renameBRolls = model.settings().bRollRenaming();
     generation.load.rateAdvice = "check the file and the frame rate of the project";
     generation.load.refusesSameTimecodes = !options.isForced;
-    generation.load.shifts = shiftsOf(options);
     if (options.changeFiles.empty())
         return {generateChangeEdl(model, generation, terminal), {}};
     generation.load.acceptAudio = true;
+    generation.load.shifts = shiftsOf(options);
     generation.load.shiftedTimes = FileShifts::Times::Both;
     return {std::nullopt, loadEvents(EdlLoader(generation.load, terminal), options.changeFiles, model.changeEdl())};
 }

@@ -82,8 +82,6 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     if (options.changeFile == "-")
         throw UsageError{"-o: \"-\" is no file name; the list goes to standard output with --json -"};
     checkOutputs(options, filesOf(options.changeFile, 1));
-    GenerationOptions generation = options.generation;
-    generation.load.shifts = FileShifts(options.generation.shifts, inputsOf(options.generation));
 
     // Deleting long lists event by event takes a while; the end of the program frees them at once.
     static DataModel& model = *new DataModel;
@@ -91,8 +89,8 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     const ProjectFramerate framerate(
         EdlLoader(options.generation.load, terminal).chooseRate(options.generation.oldFiles.front()));
     const std::string rate = ProjectFramerate::labelOf(framerate.getFramerate());
-    const Cuts cuts = generateChangeEdl(model, generation, terminal);
-    requireChangeEvents(model, generation);
+    const Cuts cuts = generateChangeEdl(model, options.generation, terminal);
+    requireChangeEvents(model, options.generation);
     const GenerationReport report(model, model.changeEdl(), cuts, framerate.getFramerate());
     const std::vector<std::string> changeFiles = filesOf(options.changeFile, model.changeEdl().size());
     checkOutputs(options, changeFiles);

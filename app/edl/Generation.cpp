@@ -124,10 +124,10 @@ std::vector<std::string> takeEvents(std::list<LoadedEdl> edls, EventList& events
     return names;
 }
 
-std::vector<std::string> loadCut(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events,
-                                 const LoadOptions& options, Terminal& terminal)
+std::vector<std::string> loadCut(const std::vector<std::string>& files, EventList& events, const LoadOptions& options,
+                                 Terminal& terminal)
 {
-    std::list<LoadedEdl> edls = loader.load(files);
+    std::list<LoadedEdl> edls = EdlLoader(options, terminal).load(files);
     requireParted(edls, options.refusesSameTimecodes || options.strict, terminal);
     return takeEvents(std::move(edls), events);
 }
@@ -139,11 +139,17 @@ std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<s
     return takeEvents(loader.load(files), events);
 }
 
+Cuts loadCuts(DataModel& model, const GenerationOptions& options, Terminal& terminal)
+{
+    LoadOptions load = options.load;
+    load.shifts = FileShifts(options.shifts, inputsOf(options));
+    return {loadCut(options.oldFiles, model.oldEdl(), load, terminal),
+            loadCut(options.newFiles, model.newEdl(), load, terminal)};
+}
+
 Cuts generateChangeEdl(DataModel& model, const GenerationOptions& options, Terminal& terminal)
 {
-    const EdlLoader loader(options.load, terminal);
-    const Cuts cuts{loadCut(loader, options.oldFiles, model.oldEdl(), options.load, terminal),
-                    loadCut(loader, options.newFiles, model.newEdl(), options.load, terminal)};
+    const Cuts cuts = loadCuts(model, options, terminal);
     generate(model, options, terminal);
     return cuts;
 }

@@ -99,6 +99,10 @@ void leaveOutIfNeedless(CurvePoints& run, const Counted<AutomationPoint>& point)
         run.erase(found);
 }
 
+/// In seconds. A point of a copy that is further away than this from where it was copied belongs to a preview, and not to the
+/// programme around it.
+constexpr double FarAway = 600.0;
+
 /// The first of the points in and at a range that has a value; null when none has it.
 Counted<AutomationPoint> firstWithValue(const PointsAround& around, double value)
 {
@@ -174,7 +178,7 @@ void replaceCurve(Envelope& curve, double start, double end, const CurvePoints& 
         const auto kept = firstWithValue(around, run.front()->value());
         if (kept && run.front() == outerEnd)
             run = {outerEnd = kept};
-        else if (kept && !isHoldingPoint(kept) && run.front() == around.behind)
+        else if (kept && !isHoldingPoint(kept) && run.front()->start() - kept->start() > FarAway)
             run = {outerEnd = kept, around.behind};
     }
 

@@ -48,7 +48,7 @@ TEST(CommandLine, HelpOfEachCommandHasAnExample)
 
 TEST(CommandLine, ACommandIsNeeded)
 {
-    expectWrongUsage({}, "generate, apply, list or show");
+    expectWrongUsage({}, "generate, apply, notes, list or show");
     expectWrongUsage({"conform"}, "conform");
 }
 

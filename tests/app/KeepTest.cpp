@@ -774,6 +774,10 @@ TEST(Shift, MovesTheTimecodesOfItsFileAloneInEveryCommand)
                                         reels.first, "--shift", "r2.edl=+02:00:00:00", "--json", "-"});
     ASSERT_EQ(generate.status, 0) << generate.err;
     EXPECT_EQ(generate.err, "");
+    const Outcome notes = runCadrel({"notes", "--rate", "24 fps", "--old", reels.first, reels.second, "--new",
+                                     reels.first, reels.second, "--shift", "r2.edl=+02:00:00:00"});
+    EXPECT_EQ(notes.status, 0);
+    EXPECT_EQ(notes.err, "");
 }
 
 TEST(Shift, WhatIsNoShiftIsWrongUsage)

@@ -44,13 +44,19 @@ void renameBRollsOf(const EventList& list)
     }
 }
 
+/// Without one no timecode of a file could be taken, and the list would stay empty without a word.
+void requireFramerate()
+{
+    if (!Timecode::framerateProvider())
+        throw Result::NotAvailable;
+}
+
 } // namespace
 
 void EventList::load(const std::wstring& fileName, bool append, Framerate& framerate, bool renameBRolls,
                      bool acceptAudioChannels)
 {
-    if (!Timecode::framerateProvider())
-        throw Result::NotAvailable;
+    requireFramerate();
     if (!append)
         clear();
     load(fileName, framerate, renameBRolls, acceptAudioChannels, *fileio::parserFor(fileName));
@@ -59,6 +65,7 @@ void EventList::load(const std::wstring& fileName, bool append, Framerate& frame
 void EventList::load(const std::wstring& fileName, Framerate& framerate, bool renameBRolls, bool acceptAudioChannels,
                      fileio::ParserInterface& parser)
 {
+    requireFramerate();
     EventList loaded;
     const Result::Type result = parser.parse(fileName, loaded, framerate, acceptAudioChannels);
     if (result != Result::Ok)

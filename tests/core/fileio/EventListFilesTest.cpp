@@ -8,6 +8,7 @@
 #include "tests/support/core/EdlReading.h"
 #include "tests/support/core/EventMaking.h"
 #include "tests/support/core/RecordingListener.h"
+#include "tests/support/core/TestProject.h"
 #include "util/Result.h"
 
 #include <gtest/gtest.h>
@@ -75,9 +76,11 @@ TEST(EventListFiles, LoadingWithoutAFramerateProviderIsNotAvailableAndChangesNot
     const auto path = folder.write("reel.edl", edlOf({"NEW"}));
     EventList events;
     events.add(std::make_shared<EventBase>());
+    const std::wstring widened = widePath(path);
 
-    EXPECT_EQ(thrownBy([&] { events.load(widePath(path), false); }), Result::NotAvailable);
-    EXPECT_EQ(thrownBy([&] { events.load(widePath(path), true); }), Result::NotAvailable);
+    const NoProject none;
+    EXPECT_EQ(thrownBy([&] { events.load(widened, false); }), Result::NotAvailable);
+    EXPECT_EQ(thrownBy([&] { events.load(widened, true); }), Result::NotAvailable);
 
     EXPECT_EQ(events.size(), 1U);
 }

@@ -198,10 +198,17 @@ private:
             const auto point = makeCounted<AutomationPoint>();
             point->setSpan(at, at);
             point->setValue(static_cast<double>(m_chance.below(5)) / 4.0);
-            // Of three points at one time the one in the middle doesn't count, and is lost where a range begins or ends.
-            if (!twoStandAt(curve, at))
+            // Of three points at one time the one in the middle doesn't count, nor does one of two with the same value. Such a
+            // point is lost where a range begins or ends.
+            if (!twoStandAt(curve, at) && !standsAt(curve, at, point->value()))
                 point->insertInto(curve);
         }
+    }
+
+    static bool standsAt(const Envelope& curve, double time, double value)
+    {
+        const auto* const point = dynamic_cast<const AutomationPoint*>(curve.firstChildFrom(time));
+        return point && point->start() == time && point->value() == value;
     }
 
     static bool twoStandAt(const Envelope& curve, double time)

@@ -1,0 +1,25 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "app/edl/Generation.h"
+
+#include <cstdint>
+#include <string>
+
+namespace cadrel::app {
+
+class Terminal;
+
+struct NotesOptions {
+    GenerationOptions generation;
+    std::string outputFile; ///< its extension tells the form; empty: text on standard output
+    std::int32_t simplify = 0;
+    bool showsFeet = false;
+    bool isLetter = false; ///< the paper of a PDF is Letter, else A4
+};
+
+/// `cadrel notes`: what has changed between two cuts, as steps to be carried out by hand. Throws Failure and UsageError.
+void runNotes(const NotesOptions& options, Terminal& terminal);
+
+} // namespace cadrel::app

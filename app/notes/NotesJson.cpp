@@ -1,0 +1,214 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/notes/NotesText.h"
+#include "app/notes/NotesWording.h"
+#include "core/edl/EventBase.h"
+
+#include <nlohmann/json.hpp>
+#include <optional>
+#include <string>
+
+namespace cadrel::app {
+
+using core::NoteEntry;
+using core::NoteStep;
+using core::PictureChange;
+using nlohmann::ordered_json;
+
+namespace {
+
+constexpr int Schema = 1;
+
+std::string textOf(const ordered_json& value)
+{
+    return value.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+}
+
+class JsonForm {
+public:
+    explicit JsonForm(const NotesDocument& document) : m_document(document), m_words(document) {}
+
+    void write(const NotesSink& sink) const
+    {
+        sink("{\n\"schema\": " + std::to_string(Schema));
+        const auto add = [&sink](const char* key, const ordered_json& value) {
+            sink(std::string(",\n\"") + key + "\": " + textOf(value));
+        };
+        add("old", cutJson(false));
+        add("new", cutJson(true));
+        add("rate", m_document.rate);
+        add("match", m_document.matchBy == core::MatchBy::ClipName ? "clip" : "roll");
+        add("simplifyFrames", m_document.simplify);
+        add("totals", totalsJson());
+        add("healed", {{"events", m_document.healing.events},
+                       {"members", m_document.healing.members},
+                       {"bridgedGaps", m_document.healing.bridgedGaps}});
+        add("largest", largestJson());
+        sink(",\n\"reels\": [");
+        for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
+            writeReel(reel, sink);
+        sink("\n]\n}\n");
+    }
+
+private:
+    ordered_json cutJson(bool isNew) const
+    {
+        const core::EventList& events = isNew ? m_document.newEvents : m_document.oldEvents;
+        const core::Programme& cut = isNew ? m_document.notes.newCut() : m_document.notes.oldCut();
+        ordered_json doubts = ordered_json::array();
+        for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
+            const core::EventBase& event = events.at(static_cast<std::size_t>(doubtful.event));
+            ordered_json flaws = ordered_json::array();
+            for (const std::int32_t flaw : event.flaws())
+                flaws.push_back(wordOfFlaw(flaw));
+            ordered_json doubt = shotJson(&event);
+            doubt["doubt"] = wordOf(doubtful.doubt);
+            doubt["flaws"] = std::move(flaws);
+            doubts.push_back(std::move(doubt));
+        }
+        return {{"files", isNew ? m_document.cuts.newNames : m_document.cuts.oldNames},
+                {"events", events.size()},
+                {"invalid", events.countInvalid()},
+                {"doubts", std::move(doubts)}};
+    }
+
+    ordered_json totalsJson() const
+    {
+        const core::NoteTotals& totals = m_document.notes.totals();
+        return {{"framesBefore", totals.before},
+                {"framesAfter", totals.after},
+                {"keptFrames", totals.kept},
+                {"liftedFrames", totals.lifted},
+                {"insertedFrames", totals.inserted},
+                {"doubledFrames", totals.doubled},
+                {"movedFrames", totals.moved},
+                {"steps", totals.steps},
+                {"reels", m_document.notes.reels().size()}};
+    }
+
+    ordered_json largestJson() const
+    {
+        ordered_json numbers = ordered_json::array();
+        for (const NoteEntry* const entry : m_document.notes.largestSteps())
+            numbers.push_back(entry->number);
+        return numbers;
+    }
+
+    ordered_json reelJson(const core::Programme& cut, const std::optional<std::size_t>& reel) const
+    {
+        if (!reel)
+            return nullptr;
+        return {{"start", m_words.timecode(cut.reels()[*reel].timecodeStart)}, {"frames", cut.reels()[*reel].length}};
+    }
+
+    void writeReel(std::size_t index, const NotesSink& sink) const
+    {
+        const core::ReelNotes& reel = m_document.notes.reels()[index];
+        sink((index == 0 ? "\n" : ",\n") + std::string("{\"reel\": ") + std::to_string(index + 1) +
+             ", \"old\": " + textOf(reelJson(m_document.notes.oldCut(), reel.pair.oldReel)) +
+             ", \"new\": " + textOf(reelJson(m_document.notes.newCut(), reel.pair.newReel)) + ", \"rows\": [");
+        const char* separator = "\n";
+        for (const NoteEntry& entry : reel.entries) {
+            sink(separator + textOf(entry.step() == nullptr ? keptJson(entry) : stepJson(entry)));
+            separator = ",\n";
+        }
+        sink("\n]}");
+    }
+
+    ordered_json keptJson(const NoteEntry& entry) const
+    {
+        const core::KeptStretch& kept = *entry.kept();
+        return {{"row", "kept"},
+                {"oldIn", m_words.timecode(m_document.notes.oldTimecode(kept.oldStart))},
+                {"newIn", m_words.timecode(m_document.notes.newTimecode(kept.newStart))},
+                {"frames", kept.length},
+                {"offsetFrames",
+                 m_document.notes.newTimecode(kept.newStart) - m_document.notes.oldTimecode(kept.oldStart)}};
+    }
+
+    ordered_json placeJson(const core::WorkPlace& place) const
+    {
+        ordered_json json{{"reel", place.reel + 1},
+                          {"timecode", m_words.timecode(m_document.notes.timecodeOf(place))},
+                          {"frame", place.frame}};
+        if (m_document.showsFeet)
+            json["feet"] = NotesWording::feet(place.frame);
+        return json;
+    }
+
+    ordered_json stepJson(const NoteEntry& entry) const
+    {
+        const NoteStep& step = *entry.step();
+        ordered_json json{{"row", "step"},
+                          {"number", entry.number},
+                          {"action", wordOf(step.action)},
+                          {"at", placeJson(step.place)},
+                          {"deleteFrames", step.removed},
+                          {"insertFrames", step.inserted.length}};
+        if (step.inserted.length > 0)
+            json["insertFrom"] = m_words.timecode(m_document.notes.newTimecode(step.inserted.start));
+        if (step.action == core::StepAction::Move) {
+            json["from"] = placeJson(step.from);
+            json["moveFrames"] = step.moved;
+        }
+        json["lengthChangeFrames"] = entry.lengthChange;
+        json["offsetFrames"] = entry.runningOffset;
+        json["joinedSteps"] = step.joined;
+        ordered_json changes = ordered_json::array();
+        std::size_t doubled = 0;
+        for (const PictureChange& change : step.changes) {
+            changes.push_back(changeJson(change));
+            if (change.kind == core::ChangeKind::Doubled && doubled < step.doubledFrom.size())
+                changes.back()["standsAt"] = placeJson(step.doubledFrom[doubled++]);
+        }
+        json["changes"] = std::move(changes);
+        return json;
+    }
+
+    ordered_json changeJson(const PictureChange& change) const
+    {
+        ordered_json json{{"kind", wordOf(change.kind)}, {"frames", change.frames}};
+        if (change.oldShot != nullptr)
+            json["oldShot"] = shotJson(change.oldShot);
+        if (change.newShot != nullptr)
+            json["newShot"] = shotJson(change.newShot);
+        if (change.inOld)
+            json["old"] = {{"in", m_words.timecode(m_document.notes.oldTimecode(change.inOld->start))},
+                           {"frames", change.inOld->length}};
+        if (change.inNew)
+            json["new"] = {{"in", m_words.timecode(m_document.notes.newTimecode(change.inNew->start))},
+                           {"frames", change.inNew->length}};
+        if (change.shots > 1)
+            json["shots"] = change.shots;
+        if (change.isPart)
+            json["part"] = true;
+        return json;
+    }
+
+    static ordered_json shotJson(const core::EventBase* shot)
+    {
+        return {{"event", shot->eventNumber()},
+                {"roll", shot->rollName()},
+                {"clip", shot->clipName()},
+                {"srcIn", shot->srcIn().toString()},
+                {"srcOut", shot->srcOut().toString()},
+                {"speed", shot->motionSpeed()},
+                {"transition", shot->transitionType() == core::TransitionType::Wipe ? "wipe"
+                               : shot->isTransition()                               ? "dissolve"
+                                                                                    : "cut"},
+                {"transitionFrames", shot->transitionDuration()},
+                {"edlFile", shot->edlFileName()}};
+    }
+
+    const NotesDocument& m_document;
+    NotesWording m_words;
+};
+
+} // namespace
+
+void writeNotesJson(const NotesDocument& document, const NotesSink& sink)
+{
+    JsonForm(document).write(sink);
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,124 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/notes/NotesPage.h"
+
+namespace cadrel::app {
+
+const std::string_view NotesPage::Style = R"(
+:root { color-scheme: light dark; --paper: #fbfaf8; --ink: #1d1f22; --dim: #6c7178; --line: #dddad4; --card: #fff;
+  --kept: #7d93ad; --moved: #d38a1f; --lifted: #c8453b; --inserted: #2f9460; --doubled: #8a5bbf; --other: #3b78c4; }
+@media (prefers-color-scheme: dark) {
+  :root { --paper: #17191c; --ink: #e4e5e7; --dim: #969ca5; --line: #33373d; --card: #1f2226;
+    --kept: #64799a; --moved: #e0a13f; --lifted: #e26a60; --inserted: #4db582; --doubled: #a983d8; --other: #6ba3e6; } }
+* { box-sizing: border-box; }
+body { margin: 0; padding: 28px; background: var(--paper); color: var(--ink); font: 15px/1.45 system-ui, sans-serif; }
+main { max-width: 1180px; margin: 0 auto; }
+h1 { font-size: 25px; margin: 0 0 2px; } h2 { font-size: 18px; margin: 34px 0 2px; }
+p { margin: 0 0 12px; } .dim { color: var(--dim); }
+.numbers { display: flex; flex-wrap: wrap; gap: 10px; margin: 16px 0 22px; padding: 0; list-style: none; }
+.numbers li { background: var(--card); border: 1px solid var(--line); border-radius: 6px; padding: 7px 13px; }
+.numbers b { display: block; font: 600 17px ui-monospace, monospace; } .numbers span { font-size: 13px; color: var(--dim); }
+.strip { background: var(--card); border: 1px solid var(--line); border-radius: 6px; padding: 10px 14px; }
+.strip div { display: flex; justify-content: space-between; gap: 16px; font-size: 13px; color: var(--dim); }
+.strip .tc, td.tc { font-family: ui-monospace, monospace; font-variant-numeric: tabular-nums; white-space: nowrap; }
+svg { display: block; width: 100%; height: 190px; margin: 4px 0; cursor: pointer; }
+svg:focus-visible, tr:focus-visible, button:focus-visible { outline: 2px solid var(--other); outline-offset: 1px; }
+.base { fill: var(--line); } .reel { stroke: var(--ink); stroke-width: 1.5; vector-effect: non-scaling-stroke; }
+.kept { fill: var(--kept); fill-opacity: .34; } .seen { fill: var(--kept); }
+.moved { fill: var(--moved); fill-opacity: .62; } .doubled { fill: var(--doubled); fill-opacity: .62; }
+.lifted { fill: var(--lifted); } .inserted { fill: var(--inserted); }
+svg .on { fill-opacity: 1; stroke: var(--ink); stroke-width: 1; vector-effect: non-scaling-stroke; }
+svg [data-step]:hover { fill-opacity: .95; }
+.tools { display: flex; flex-wrap: wrap; gap: 6px 14px; align-items: center; margin: 14px 0 6px; font-size: 14px; }
+.tools label { display: inline-flex; gap: 5px; align-items: center; }
+.tools button { font: inherit; padding: 2px 10px; background: var(--card); color: inherit; border: 1px solid var(--line);
+  border-radius: 5px; }
+table { width: 100%; border-collapse: collapse; margin-top: 10px; }
+th { text-align: left; font-size: 13px; font-weight: 500; color: var(--dim); border-bottom: 1px solid var(--line);
+  padding: 4px 10px; }
+td { padding: 6px 10px; border-bottom: 1px solid var(--line); vertical-align: top; }
+td.tc { font-size: 13.5px; } .num { text-align: right !important; }
+tr.k td { padding-top: 2px; padding-bottom: 2px; font-size: 12.5px; color: var(--dim); }
+tr.on td { background: color-mix(in srgb, var(--other) 16%, transparent); }
+tbody tr[id] { scroll-margin-top: 20px; cursor: pointer; }
+.tag { display: inline-block; font-size: 12px; padding: 0 7px; border-radius: 9px; color: #fff; background: var(--other);
+  margin-right: 7px; white-space: nowrap; }
+@media (prefers-color-scheme: dark) { .tag { color: #101214; } }
+.tag.lifted, .tag.head-trimmed, .tag.tail-trimmed { background: var(--lifted); }
+.tag.plus, .tag.inserted { background: var(--inserted); } .tag.moved { background: var(--moved); }
+.tag.doubled { background: var(--doubled); }
+.change { margin: 0 0 2px; } .change small { color: var(--dim); }
+ol.largest { columns: 2; column-gap: 40px; padding-left: 24px; margin: 8px 0; font-size: 14px; }
+ol.largest a { color: inherit; }
+[hidden] { display: none !important; }
+@media (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
+@media print { :root { --paper: #fff; --card: #fff; } body { padding: 0; font-size: 10pt; } .tools { display: none; }
+  * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2 { break-after: avoid; }
+  svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } td.tc { font-size: 8pt; }
+  tr.k td { font-size: 7.5pt; } }
+)";
+
+const std::string_view NotesPage::Script = R"(
+const svg = document.querySelector('svg'), whole = svg.viewBox.baseVal.width;
+const rows = [...document.querySelectorAll('tr[id]')];
+let left = 0, width = whole, at = -1;
+function show() {
+  width = Math.min(whole, Math.max(whole / 2000, width));
+  left = Math.min(whole - width, Math.max(0, left));
+  svg.setAttribute('viewBox', `${left} 0 ${width} 190`);
+}
+function zoom(factor, middle = left + width / 2) {
+  const share = (middle - left) / width;
+  width = Math.min(whole, width * factor);
+  left = middle - share * width;
+  show();
+}
+function choose(id, scrolls) {
+  document.querySelectorAll('.on').forEach(e => e.classList.remove('on'));
+  const row = document.getElementById(id);
+  if (!row) return;
+  at = rows.indexOf(row);
+  row.classList.add('on');
+  if (scrolls) row.scrollIntoView({ block: 'center' });
+  document.querySelectorAll(`svg [data-step="${id}"]`).forEach(e => e.classList.add('on'));
+}
+function reveal(id) {
+  const mark = document.querySelector(`svg [data-step="${id}"]`);
+  if (!mark || width === whole) return;
+  const box = mark.getBBox();
+  if (box.x < left || box.x + box.width > left + width) { left = box.x + box.width / 2 - width / 2; show(); }
+}
+function step(way) {
+  for (let i = at + way; i >= 0 && i < rows.length; i += way)
+    if (!rows[i].hidden && !rows[i].classList.contains('k')) { choose(rows[i].id, true); reveal(rows[i].id); return; }
+}
+svg.addEventListener('click', e => { if (e.target.dataset.step) choose(e.target.dataset.step, true); });
+svg.addEventListener('wheel', e => {
+  if (!e.ctrlKey && !e.shiftKey) return;
+  e.preventDefault();
+  const box = svg.getBoundingClientRect();
+  zoom(e.deltaY > 0 ? 1.25 : 0.8, left + (e.clientX - box.left) / box.width * width);
+}, { passive: false });
+rows.forEach(row => row.addEventListener('click', () => { choose(row.id, false); reveal(row.id); }));
+document.addEventListener('keydown', e => {
+  if (e.ctrlKey || e.altKey || e.metaKey) return;
+  const act = { '+': () => zoom(0.6), '=': () => zoom(0.6), '-': () => zoom(1.7), '0': () => zoom(1e9),
+    'n': () => step(1), 'p': () => step(-1) }[e.key];
+  if (act) { act(); e.preventDefault(); return; }
+  if (document.activeElement === svg && (e.key === 'ArrowLeft' || e.key === 'ArrowRight')) {
+    left += (e.key === 'ArrowLeft' ? -0.2 : 0.2) * width; show(); e.preventDefault();
+  }
+  if (e.key === 'Enter' && document.activeElement.matches('tr[id]')) document.activeElement.click();
+});
+const boxes = [...document.querySelectorAll('.tools input')];
+function filter() {
+  const shown = new Set(boxes.filter(b => b.checked).map(b => b.value));
+  rows.forEach(row => { row.hidden = !row.dataset.kinds.split(' ').some(kind => shown.has(kind)); });
+}
+boxes.forEach(box => box.addEventListener('change', filter));
+document.querySelectorAll('[data-zoom]').forEach(b => b.addEventListener('click', () => zoom(+b.dataset.zoom)));
+document.querySelectorAll('a[href^="#s"]').forEach(a => a.addEventListener('click', e => {
+  e.preventDefault(); choose(a.hash.slice(1), true); reveal(a.hash.slice(1)); }));
+)";
+
+} // namespace cadrel::app

@@ -1,0 +1,329 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/notes/NotesPdf.h"
+
+#include "app/console/Printable.h"
+#include "app/console/Wording.h"
+#include "app/notes/NotesWording.h"
+#include "app/notes/PdfPages.h"
+
+#include <algorithm>
+#include <functional>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace cadrel::app {
+
+using core::FrameRange;
+using core::NoteEntry;
+using core::PictureChange;
+
+namespace {
+
+constexpr double Margin = 42;
+constexpr double FootHeight = 22;
+constexpr double StripHeight = 14;
+constexpr double BandHeight = 84;
+
+constexpr PdfColour Ink{0.11, 0.12, 0.13};
+constexpr PdfColour Dim{0.42, 0.45, 0.48};
+constexpr PdfColour Rule{0.85, 0.84, 0.82};
+constexpr PdfColour Kept{0.49, 0.58, 0.68};
+constexpr PdfColour Band{0.49, 0.58, 0.68, 0.34};
+constexpr PdfColour Moved{0.83, 0.54, 0.12, 0.7};
+constexpr PdfColour Doubled{0.54, 0.36, 0.75, 0.7};
+constexpr PdfColour Lifted{0.78, 0.27, 0.23};
+constexpr PdfColour Inserted{0.18, 0.58, 0.38};
+
+constexpr PdfFont TitleFont{"sans-serif", 19, true};
+constexpr PdfFont HeadingFont{"sans-serif", 12, true};
+constexpr PdfFont BodyFont{"sans-serif", 8.5};
+constexpr PdfFont SmallFont{"sans-serif", 7.5};
+constexpr PdfFont TimeFont{"monospace", 8};
+constexpr PdfFont SmallTimeFont{"monospace", 7};
+
+/// What can't be broken over two pages.
+struct Piece {
+    double height;
+    std::function<void(PdfPages&, double top)> draw;
+    bool goesWithNext = false; ///< a heading
+};
+
+class PdfForm {
+public:
+    PdfForm(const NotesDocument& document, const NotesSink& sink)
+        : m_document(document), m_words(document),
+          m_pages(document.isLetter ? 612.0 : 595.28, document.isLetter ? 792.0 : 841.89, sink)
+    {
+        m_right = m_pages.width() - Margin;
+        m_lengthRight = m_right - 78;
+    }
+
+    void write()
+    {
+        addHead();
+        add(2 * StripHeight + BandHeight + 44, [this](PdfPages&, double top) { drawPicture(top); });
+        addLargest();
+        for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
+            addReel(reel);
+        addRemarks();
+        drawPages();
+        m_pages.finish();
+    }
+
+private:
+    void add(double height, std::function<void(PdfPages&, double)> draw, bool goesWithNext = false)
+    {
+        m_pieces.push_back({height, std::move(draw), goesWithNext});
+    }
+
+    void addText(const std::string& text, const PdfFont& font, const PdfColour& colour, double height,
+                 bool goesWithNext = false)
+    {
+        add(
+            height,
+            [this, text, font, colour, height](PdfPages& pages, double top) {
+                pages.text(Margin, top + height - 4, pages.fitting(text, font, m_right - Margin), font, colour);
+            },
+            goesWithNext);
+    }
+
+    void addHead()
+    {
+        const core::NoteTotals& totals = m_document.notes.totals();
+        const auto time = [this](std::int32_t frames) { return m_words.timecode(frames); };
+        addText("Change notes", TitleFont, Ink, 22);
+        add(6, [](PdfPages&, double) {});
+        addText("Old cut: " + m_words.cutText(false), BodyFont, Dim, 13);
+        addText("New cut: " + m_words.cutText(true), BodyFont, Dim, 13);
+        addText(concatenated({m_document.rate, ", ", time(totals.before), " before, ", time(totals.after), " after, ",
+                              m_words.change(totals.after - totals.before), ", ", counted(totals.steps, "step")}),
+                BodyFont, Ink, 13);
+        addText(concatenated({time(totals.lifted), " lifted, ", time(totals.inserted), " inserted, ",
+                              time(totals.moved), " moved, ", time(totals.doubled), " doubled"}),
+                BodyFont, Ink, 13);
+    }
+
+    double xOf(std::int32_t frame) const
+    {
+        const std::int32_t longest =
+            std::max({1, m_document.notes.oldCut().length(), m_document.notes.newCut().length()});
+        return Margin + (m_right - Margin) * frame / longest;
+    }
+
+    void drawBox(const FrameRange& frames, double top, const PdfColour& colour)
+    {
+        const double left = xOf(frames.start);
+        m_pages.box(left, top, std::max(0.3, xOf(frames.end()) - left), StripHeight, colour);
+    }
+
+    void drawBand(const FrameRange& inOld, const FrameRange& inNew, double top, const PdfColour& colour)
+    {
+        m_pages.band(xOf(inOld.start), xOf(inOld.end()), top, xOf(inNew.start), xOf(inNew.end()), top + BandHeight,
+                     colour);
+    }
+
+    void drawPicture(double top)
+    {
+        const double oldTop = top + 18;
+        const double bandTop = oldTop + StripHeight;
+        const double newTop = bandTop + BandHeight;
+        m_pages.text(Margin, oldTop - 4, "old cut", SmallFont, Dim);
+        m_pages.text(Margin, newTop + StripHeight + 10, "new cut", SmallFont, Dim);
+        drawBox({0, m_document.notes.oldCut().length()}, oldTop, Kept);
+        drawBox({0, m_document.notes.newCut().length()}, newTop, Kept);
+        std::vector<FrameRange> moves;
+        for (const core::ReelNotes& reel : m_document.notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                if (entry.step() != nullptr && entry.step()->action == core::StepAction::Move)
+                    moves.push_back(*entry.step()->changes.front().inNew);
+            }
+        }
+        std::sort(moves.begin(), moves.end(),
+                  [](const FrameRange& a, const FrameRange& b) { return a.start < b.start; });
+        for (const bool drawsMoves : {false, true}) {
+            for (const core::ReelNotes& reel : m_document.notes.reels()) {
+                for (const NoteEntry& entry : reel.entries)
+                    drawEntry(entry, moves, drawsMoves, oldTop, newTop);
+            }
+        }
+    }
+
+    void drawEntry(const NoteEntry& entry, const std::vector<FrameRange>& moves, bool drawsMoves, double oldTop,
+                   double newTop)
+    {
+        const double bandTop = oldTop + StripHeight;
+        if (const core::KeptStretch* const kept = entry.kept()) {
+            const auto after =
+                std::upper_bound(moves.begin(), moves.end(), kept->newStart,
+                                 [](std::int32_t frame, const FrameRange& move) { return frame < move.start; });
+            const bool isMoved = after != moves.begin() && kept->newStart < (after - 1)->end();
+            if (isMoved == drawsMoves)
+                drawBand({kept->oldStart, kept->length}, {kept->newStart, kept->length}, bandTop,
+                         isMoved ? Moved : Band);
+            return;
+        }
+        const core::NoteStep& step = *entry.step();
+        if (!drawsMoves || step.action != core::StepAction::Replace)
+            return;
+        for (const FrameRange& removed : step.removedFrames)
+            drawBox(removed, oldTop, Lifted);
+        if (step.inserted.length > 0)
+            drawBox(step.inserted, newTop, Inserted);
+        for (const PictureChange& change : step.changes) {
+            if (change.kind == core::ChangeKind::Doubled)
+                drawBand(*change.inOld, *change.inNew, bandTop, Doubled);
+        }
+    }
+
+    void addLargest()
+    {
+        const auto steps = m_document.notes.largestSteps();
+        if (steps.empty()) {
+            addText("Nothing has changed.", BodyFont, Ink, 16);
+            return;
+        }
+        addText("The largest changes", HeadingFont, Ink, 24, true);
+        for (const NoteEntry* const entry : steps) {
+            addText(concatenated({"step ", std::to_string(entry->number), ": ", m_words.action(*entry), ", ",
+                                  m_words.describe(NotesWording::largestChange(*entry)).shot}),
+                    BodyFont, Ink, 12.5);
+        }
+    }
+
+    void addReel(std::size_t reel)
+    {
+        addText(m_words.reelTitle(reel), HeadingFont, Ink, 32, true);
+        addText(m_words.reelLengths(reel), BodyFont, Dim, 13, true);
+        add(
+            18,
+            [this](PdfPages& pages, double top) {
+                const double y = top + 11;
+                pages.textToRight(Margin + 20, y, "step", SmallFont, Dim);
+                pages.text(Margin + 28, y, "at", SmallFont, Dim);
+                pages.text(Margin + 92, y, "what to do, and what changes", SmallFont, Dim);
+                pages.textToRight(m_lengthRight, y, "length", SmallFont, Dim);
+                pages.textToRight(m_right, y, "offset", SmallFont, Dim);
+                pages.box(Margin, top + 15, m_right - Margin, 0.5, Rule);
+            },
+            true);
+        for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
+            addRow(entry, reel);
+    }
+
+    void addRow(const NoteEntry& entry, std::size_t reel)
+    {
+        if (entry.kept() != nullptr) {
+            add(10.5,
+                [this, &entry, reel](PdfPages&, double top) { drawTimes(entry, reel, top + 8, SmallTimeFont, Dim); });
+            return;
+        }
+        const std::size_t lines = linesOf(entry).size();
+        add(static_cast<double>(lines) * 10.5 + 15, [this, &entry, reel](PdfPages& pages, double top) {
+            drawTimes(entry, reel, top + 10, TimeFont, Ink);
+            double y = top + 10;
+            for (const auto& [text, colour] : linesOf(entry)) {
+                y += 10.5;
+                pages.text(Margin + 92, y, pages.fitting(text, SmallFont, m_right - Margin - 92), SmallFont, colour);
+            }
+            pages.box(Margin, y + 4, m_right - Margin, 0.4, Rule);
+        });
+    }
+
+    std::vector<std::pair<std::string, PdfColour>> linesOf(const NoteEntry& entry) const
+    {
+        std::vector<std::pair<std::string, PdfColour>> lines;
+        for (const PictureChange& change : entry.step()->changes) {
+            const ChangeWords words = m_words.describe(change);
+            lines.emplace_back(concatenated({words.shot, ": ", words.what, words.more.empty() ? "" : ", ", words.more}),
+                               Ink);
+        }
+        if (entry.step()->joined > 1)
+            lines.emplace_back(
+                concatenated({"joined from ", std::to_string(entry.step()->joined), " trims that cancel out"}), Dim);
+        if (m_document.showsFeet)
+            lines.emplace_back(m_words.inFeet(entry), Dim);
+        return lines;
+    }
+
+    void drawTimes(const NoteEntry& entry, std::size_t reel, double y, const PdfFont& font, const PdfColour& colour)
+    {
+        if (entry.number > 0)
+            m_pages.textToRight(Margin + 20, y, std::to_string(entry.number), BodyFont, colour);
+        m_pages.text(Margin + 28, y, m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel))), font,
+                     colour);
+        m_pages.text(Margin + 92, y, m_words.action(entry), font, colour);
+        if (entry.lengthChange != 0)
+            m_pages.textToRight(m_lengthRight, y, m_words.change(entry.lengthChange), font, colour);
+        m_pages.textToRight(m_right, y, m_words.change(entry.runningOffset), font, colour);
+    }
+
+    void addRemarks()
+    {
+        const std::vector<std::string> lines = m_words.remarks();
+        if (lines.empty())
+            return;
+        addText("Healed, doubted and passed over", HeadingFont, Ink, 32, true);
+        for (const std::string& line : lines)
+            addText(line, BodyFont, Ink, 12.5);
+    }
+
+    /// The places of the pieces after the last one of each page.
+    std::vector<std::size_t> pageEnds() const
+    {
+        const double room = m_pages.height() - 2 * Margin - FootHeight;
+        std::vector<std::size_t> ends;
+        double used = 0;
+        for (std::size_t piece = 0; piece < m_pieces.size(); ++piece) {
+            double needed = m_pieces[piece].height;
+            for (std::size_t next = piece; m_pieces[next].goesWithNext && next + 1 < m_pieces.size(); ++next)
+                needed += m_pieces[next + 1].height;
+            if (used > 0 && used + needed > room) {
+                ends.push_back(piece);
+                used = 0;
+            }
+            used += m_pieces[piece].height;
+        }
+        ends.push_back(m_pieces.size());
+        return ends;
+    }
+
+    void drawPages()
+    {
+        const std::vector<std::size_t> ends = pageEnds();
+        const std::string cuts =
+            toPrintable(concatenated({joined(m_document.cuts.oldNames), " to ", joined(m_document.cuts.newNames)}))
+                .text;
+        std::size_t piece = 0;
+        for (std::size_t page = 0; page < ends.size(); ++page) {
+            double top = Margin;
+            for (; piece < ends[page]; ++piece) {
+                m_pieces[piece].draw(m_pages, top);
+                top += m_pieces[piece].height;
+            }
+            const double y = m_pages.height() - Margin;
+            m_pages.text(Margin, y, m_pages.fitting(cuts, SmallFont, m_right - Margin - 70), SmallFont, Dim);
+            m_pages.textToRight(m_right, y,
+                                concatenated({"page ", std::to_string(page + 1), " of ", std::to_string(ends.size())}),
+                                SmallFont, Dim);
+            m_pages.endPage();
+        }
+    }
+
+    const NotesDocument& m_document;
+    NotesWording m_words;
+    PdfPages m_pages;
+    double m_right;
+    double m_lengthRight;
+    std::vector<Piece> m_pieces;
+};
+
+} // namespace
+
+void writeNotesPdf(const NotesDocument& document, const NotesSink& sink)
+{
+    PdfForm(document, sink).write();
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,159 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/notes/NotesText.h"
+
+#include "app/console/Printable.h"
+#include "app/console/Wording.h"
+#include "app/notes/NotesWording.h"
+
+#include <algorithm>
+
+namespace cadrel::app {
+
+using core::NoteEntry;
+using core::NoteTotals;
+using core::PictureChange;
+
+namespace {
+
+constexpr std::size_t Width = 80;
+constexpr std::size_t NumberWidth = 4;
+constexpr std::size_t ActionWidth = 35;
+constexpr std::size_t WhatWidth = 33;
+const std::string Indent(NumberWidth + 2, ' ');
+
+std::string padded(const std::string& text, std::size_t width)
+{
+    const std::size_t characters = toPrintable(text).width;
+    return characters < width ? text + std::string(width - characters, ' ') : text;
+}
+
+std::string trimmedEnd(std::string line)
+{
+    line.erase(line.find_last_not_of(' ') + 1);
+    return line + "\n";
+}
+
+/// Broken at blanks where it is too long; the further lines are indented.
+std::string wrapped(const std::string& text, const std::string& indent)
+{
+    std::string lines;
+    std::string line;
+    const auto widthOf = [](const std::string& part) { return toPrintable(part).width; };
+    for (std::size_t start = 0; start <= text.size();) {
+        const std::size_t end = std::min(text.find(' ', start), text.size());
+        const std::string word = text.substr(start, end - start);
+        if (!line.empty() && widthOf(line) + 1 + widthOf(word) > Width) {
+            lines += line + "\n";
+            line = indent + word;
+        } else {
+            line += (line.empty() ? "" : " ") + word;
+        }
+        start = end + 1;
+    }
+    return lines + line + "\n";
+}
+
+class TextForm {
+public:
+    explicit TextForm(const NotesDocument& document) : m_document(document), m_words(document) {}
+
+    void write(const NotesSink& sink) const
+    {
+        sink(head());
+        sink(largest());
+        for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
+            sink(concatenated({"\n", m_words.reelTitle(reel), "\n", m_words.reelLengths(reel), "\n\n"}));
+            sink(trimmedEnd(padded("step", Indent.size()) + padded("at", 13) + padded("what to do", ActionWidth + 1) +
+                            padded("      length", 13) + "      offset"));
+            for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
+                sink(rowText(entry, reel));
+        }
+        sink(remarks());
+    }
+
+private:
+    std::string head() const
+    {
+        const NoteTotals& totals = m_document.notes.totals();
+        const auto line = [](const std::string& title, const std::string& text) {
+            return padded(title, 12) + text + "\n";
+        };
+        const auto time = [this](std::int32_t frames) { return m_words.timecode(frames); };
+        return line("Old cut", m_words.cutText(false)) + line("New cut", m_words.cutText(true)) +
+               line("Frame rate", m_document.rate) +
+               line("Length", time(totals.before) + " before, " + time(totals.after) + " after, " +
+                                  m_words.change(totals.after - totals.before)) +
+               line("Old picture", time(totals.kept) + " kept, " + time(totals.lifted) + " lifted") +
+               line("New picture", time(totals.inserted) + " inserted, " + time(totals.doubled) + " doubled") +
+               line("Moved", time(totals.moved)) +
+               line("Steps", std::to_string(totals.steps) + " in " + counted(m_document.notes.reels().size(), "reel"));
+    }
+
+    std::string largest() const
+    {
+        const auto steps = m_document.notes.largestSteps();
+        if (steps.empty())
+            return "\nNothing has changed.\n";
+        std::string text = "\nThe largest changes\n";
+        for (const NoteEntry* const entry : steps) {
+            const ChangeWords words = m_words.describe(NotesWording::largestChange(*entry));
+            text += trimmedEnd(padded(numberText(entry->number), Indent.size()) +
+                               padded(m_words.action(*entry), ActionWidth) + toPrintable(words.shot, 39).text);
+        }
+        return text;
+    }
+
+    static std::string numberText(std::size_t number)
+    {
+        const std::string digits = std::to_string(number);
+        return std::string(NumberWidth - std::min(NumberWidth, digits.size()), ' ') + digits;
+    }
+
+    std::string rowText(const NoteEntry& entry, std::size_t reel) const
+    {
+        const bool isKept = entry.kept() != nullptr;
+        std::string text =
+            trimmedEnd(padded(isKept ? "" : numberText(entry.number), Indent.size()) +
+                       padded(m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel))), 13) +
+                       padded(m_words.action(entry), ActionWidth + 1) +
+                       padded(entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange), 13) +
+                       m_words.change(entry.runningOffset));
+        if (isKept)
+            return text;
+        for (const PictureChange& change : entry.step()->changes) {
+            const ChangeWords words = m_words.describe(change);
+            text += trimmedEnd(Indent + padded(words.what, WhatWidth) + "  " + words.shot);
+            if (!words.more.empty())
+                text += trimmedEnd(Indent + "  " + toPrintable(words.more, Width - Indent.size() - 2).text);
+        }
+        if (entry.step()->joined > 1)
+            text += Indent + "joined from " + std::to_string(entry.step()->joined) + " trims that cancel out\n";
+        if (m_document.showsFeet)
+            text += Indent + m_words.inFeet(entry) + "\n";
+        return text;
+    }
+
+    std::string remarks() const
+    {
+        const std::vector<std::string> lines = m_words.remarks();
+        if (lines.empty())
+            return {};
+        std::string text = "\nHealed, doubted and passed over\n";
+        for (const std::string& line : lines)
+            text += wrapped("  " + line, "    ");
+        return text;
+    }
+
+    const NotesDocument& m_document;
+    NotesWording m_words;
+};
+
+} // namespace
+
+void writeNotesText(const NotesDocument& document, const NotesSink& sink)
+{
+    TextForm(document).write(sink);
+}
+
+} // namespace cadrel::app

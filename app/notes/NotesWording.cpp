@@ -1,0 +1,328 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/notes/NotesWording.h"
+
+#include "app/console/Printable.h"
+#include "app/console/Wording.h"
+#include "app/edl/GenerationReport.h"
+#include "core/edl/EventBase.h"
+#include "core/time/Timecode.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <cstdlib>
+
+namespace cadrel::app {
+
+using core::ChangeKind;
+using core::EventBase;
+using core::NoteEntry;
+using core::NoteStep;
+using core::PictureChange;
+using core::PictureDoubt;
+using core::StepAction;
+using core::Timecode;
+using core::TransitionType;
+using core::WorkPlace;
+
+namespace {
+
+constexpr std::int32_t FramesPerFoot = 16;
+constexpr std::size_t MostCharactersOfAName = 39;
+/// So many events with the same doubt are named.
+constexpr std::size_t MostOfOneDoubt = 5;
+
+constexpr std::array<std::string_view, 12> KindWords{
+    "head-trimmed", "tail-trimmed", "lifted",          "inserted",         "replaced",           "moved",
+    "doubled",      "retimed",      "version-changed", "transition-added", "transition-removed", "transition-changed"};
+constexpr std::array<std::string_view, 3> ActionWords{"replace", "move", "relabel"};
+constexpr std::array<std::string_view, 5> DoubtWords{"no-picture", "flawed", "reversed", "nameless", "covered"};
+constexpr std::array<std::string_view, 13> FlawWords{
+    "timecode-uninitialized", "free-text",        "event-number-not-numeric", "roll-name-invalid",  "not-video-event",
+    "transition-duration",    "transition-type",  "src-in-unreadable",        "src-out-unreadable", "dst-in-unreadable",
+    "dst-out-unreadable",     "timecode-invalid", "timecode-range-invalid"};
+static_assert(static_cast<std::size_t>(ChangeKind::TransitionChanged) + 1 == KindWords.size());
+static_assert(static_cast<std::size_t>(StepAction::Relabel) + 1 == ActionWords.size());
+static_assert(static_cast<std::size_t>(PictureDoubt::Covered) + 1 == DoubtWords.size());
+static_assert(core::EventFlaw::Last + 1 == FlawWords.size());
+
+/// "-20 frames", "+1 frame".
+std::string signedFrames(std::int32_t frames)
+{
+    return concatenated({frames < 0 ? "-" : "+", counted(static_cast<std::size_t>(std::abs(frames)), "frame")});
+}
+
+std::string percent(double speed)
+{
+    return std::to_string(std::lround(speed * 100));
+}
+
+std::string_view explanationOf(PictureDoubt doubt)
+{
+    switch (doubt) {
+    case PictureDoubt::NoPicture:
+        return "no picture, or no place that can be read: passed over";
+    case PictureDoubt::Flawed:
+        return "flawed: the same picture only where the same line stands in both cuts";
+    case PictureDoubt::Reversed:
+        return "ends before it begins: the same picture only where the same line stands in both cuts";
+    case PictureDoubt::Nameless:
+        return "its name tells nothing of its material: matched by its source timecode alone";
+    case PictureDoubt::Covered:
+        break;
+    }
+    return "another event stands on top of it: only what is left is seen";
+}
+
+} // namespace
+
+std::string_view wordOf(ChangeKind kind)
+{
+    return KindWords.at(static_cast<std::size_t>(kind));
+}
+
+std::string_view wordOf(StepAction action)
+{
+    return ActionWords.at(static_cast<std::size_t>(action));
+}
+
+std::string_view wordOf(PictureDoubt doubt)
+{
+    return DoubtWords.at(static_cast<std::size_t>(doubt));
+}
+
+std::string_view wordOfFlaw(std::int32_t flaw)
+{
+    return FlawWords.at(static_cast<std::size_t>(flaw));
+}
+
+std::string concatenated(std::initializer_list<std::string_view> texts)
+{
+    std::string all;
+    for (const std::string_view text : texts)
+        all += text;
+    return all;
+}
+
+std::string NotesWording::timecode(std::int32_t frames) const
+{
+    const core::Framerate& framerate = m_document.notes.framerate();
+    Timecode timecode;
+    timecode.setFrameCount(frames % (framerate.lastFrame + 1), framerate);
+    return timecode.toString();
+}
+
+std::string NotesWording::change(std::int32_t frames) const
+{
+    return concatenated({frames < 0 ? "-" : frames > 0 ? "+" : " ", timecode(std::abs(frames))});
+}
+
+std::string NotesWording::feet(std::int32_t frames)
+{
+    const std::int32_t rest = frames % FramesPerFoot;
+    return std::to_string(frames / FramesPerFoot) + (rest < 10 ? "+0" : "+") + std::to_string(rest);
+}
+
+WorkPlace NotesWording::placeOf(const NoteEntry& entry, std::size_t reel) const
+{
+    if (const core::KeptStretch* const kept = entry.kept())
+        return {reel,
+                kept->newStart - m_document.notes.newCut().reels()[*m_document.notes.reels()[reel].pair.newReel].start};
+    const NoteStep& step = *entry.step();
+    const bool goesFurtherOn =
+        step.action == StepAction::Move &&
+        (step.place.reel != reel || (step.from.reel == reel && step.from.frame < step.place.frame));
+    return goesFurtherOn ? step.from : step.place;
+}
+
+std::string NotesWording::action(const NoteEntry& entry) const
+{
+    if (const core::KeptStretch* const kept = entry.kept())
+        return "kept " + timecode(kept->length) + ", was " + timecode(m_document.notes.oldTimecode(kept->oldStart));
+    const NoteStep& step = *entry.step();
+    switch (step.action) {
+    case StepAction::Move: {
+        const bool goesFurtherOn = step.from.reel == step.place.reel && step.from.frame < step.place.frame;
+        const WorkPlace& other = goesFurtherOn ? step.place : step.from;
+        return "move " + timecode(step.moved) + (goesFurtherOn ? " to " : " from ") +
+               timecode(m_document.notes.timecodeOf(other));
+    }
+    case StepAction::Relabel:
+        return "new version, " + timecode(step.inserted.length);
+    case StepAction::Replace:
+        break;
+    }
+    if (step.removed == 0)
+        return "insert " + timecode(step.inserted.length);
+    if (step.inserted.length == 0)
+        return "delete " + timecode(step.removed);
+    if (step.inserted.length == step.removed)
+        return "replace " + timecode(step.removed);
+    return "replace " + timecode(step.removed) + " by " + timecode(step.inserted.length);
+}
+
+const PictureChange& NotesWording::largestChange(const NoteEntry& entry)
+{
+    const auto& changes = entry.step()->changes;
+    return *std::max_element(changes.begin(), changes.end(), [](const PictureChange& a, const PictureChange& b) {
+        return std::abs(a.frames) < std::abs(b.frames);
+    });
+}
+
+std::string NotesWording::inFeet(const NoteEntry& entry) const
+{
+    const NoteStep* const step = entry.step();
+    if (step == nullptr)
+        return {};
+    const auto through = [](std::int32_t place, std::int32_t length) {
+        return feet(place) + " through " + feet(place + length - 1);
+    };
+    const std::int32_t place = step->place.frame;
+    switch (step->action) {
+    case StepAction::Move:
+        return "take out " + through(step->from.frame, step->moved) + ", insert at " + feet(place);
+    case StepAction::Relabel:
+        return "new version from " + through(place, step->inserted.length);
+    case StepAction::Replace:
+        break;
+    }
+    std::string text = step->removed > 0 ? "delete " + through(place, step->removed) : std::string();
+    if (step->inserted.length > 0)
+        text += (text.empty() ? "" : ", ") + std::string("insert ") + through(place, step->inserted.length);
+    return text;
+}
+
+std::string NotesWording::transitionText(const PictureChange& change) const
+{
+    const auto lengthOf = [](const EventBase* shot) {
+        return shot == nullptr ? std::string("?") : std::to_string(shot->transitionDuration());
+    };
+    const EventBase* const named = change.kind == ChangeKind::TransitionRemoved ? change.oldShot : change.newShot;
+    const std::string type =
+        named != nullptr && named->transitionType() == TransitionType::Wipe ? "wipe of " : "dissolve of ";
+    if (change.kind == ChangeKind::TransitionAdded)
+        return type + lengthOf(change.newShot) + " frames added";
+    if (change.kind == ChangeKind::TransitionRemoved)
+        return type + lengthOf(change.oldShot) + " frames removed";
+    return type + lengthOf(change.oldShot) + " now " + lengthOf(change.newShot) + " frames";
+}
+
+ChangeWords NotesWording::describe(const PictureChange& change) const
+{
+    const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
+    const EventBase* const shot = change.newShot != nullptr ? change.newShot : change.oldShot;
+    const std::string name = nameOf(shot);
+    const std::string length = timecode(std::abs(change.frames));
+    switch (change.kind) {
+    case ChangeKind::HeadTrimmed:
+        return {"head " + signedFrames(change.frames), name, {}};
+    case ChangeKind::TailTrimmed:
+        return {"tail " + signedFrames(change.frames), name, {}};
+    case ChangeKind::Lifted:
+        return {(change.isPart ? "part " : "lifted ") + length + oldPlace(), nameOf(change.oldShot), {}};
+    case ChangeKind::Inserted: {
+        std::string more;
+        if (shot != nullptr)
+            more = "roll " + toPrintable(shot->rollName(), 40).text + ", source " + shot->srcIn().toString();
+        return {"inserted " + length, name, more};
+    }
+    case ChangeKind::Replaced:
+        return {"replaced " + length, name, "was " + nameOf(change.oldShot) + oldPlace()};
+    case ChangeKind::Moved: {
+        const std::string more =
+            change.shots > 1 ? concatenated({" and ", std::to_string(change.shots - 1), " more"}) : "";
+        return {"moved " + length + oldPlace(), toPrintable(name, MostCharactersOfAName - more.size()).text + more, {}};
+    }
+    case ChangeKind::Doubled:
+        return {"once more " + length, name, "stood once in the old cut" + oldPlace()};
+    case ChangeKind::Retimed:
+        return {"speed " + percent(change.oldShot->motionSpeed()) + " now " + percent(change.newShot->motionSpeed()) +
+                    " %",
+                name,
+                {}};
+    case ChangeKind::VersionChanged:
+        return {"was " + toPrintable(change.oldShot == nullptr ? "" : change.oldShot->rollName(), 28).text,
+                toPrintable(shot == nullptr ? "" : shot->rollName(), MostCharactersOfAName).text,
+                {}};
+    case ChangeKind::TransitionAdded:
+    case ChangeKind::TransitionRemoved:
+    case ChangeKind::TransitionChanged:
+        break;
+    }
+    return {transitionText(change), name, {}};
+}
+
+std::string NotesWording::reelTitle(std::size_t reel) const
+{
+    const auto& notes = m_document.notes;
+    const core::ReelPair& pair = notes.reels()[reel].pair;
+    std::string title = "Reel " + std::to_string(reel + 1) + ", ";
+    if (!pair.newReel)
+        return title + timecode(notes.oldCut().reels()[*pair.oldReel].timecodeStart) + ", is gone";
+    const std::int32_t start = notes.newCut().reels()[*pair.newReel].timecodeStart;
+    title += timecode(start);
+    if (!pair.oldReel)
+        return title + ", is new";
+    const std::int32_t oldStart = notes.oldCut().reels()[*pair.oldReel].timecodeStart;
+    return oldStart == start ? title : title + ", began at " + timecode(oldStart);
+}
+
+std::string NotesWording::reelLengths(std::size_t reel) const
+{
+    const core::ReelNotes& notes = m_document.notes.reels()[reel];
+    return timecode(notes.before) + " before, " + timecode(notes.after) + " after, " +
+           change(notes.after - notes.before);
+}
+
+std::vector<std::string> NotesWording::remarks() const
+{
+    std::vector<std::string> lines;
+    const core::HealingNotes& healing = m_document.healing;
+    if (healing.events > 0) {
+        lines.push_back(counted(healing.events, "event") + " of the change EDL healed from " +
+                        std::to_string(healing.members));
+        if (healing.bridgedGaps > 0)
+            lines.push_back(counted(healing.bridgedGaps, "gap") + " covered by healing");
+    }
+    if (const std::size_t joined = m_document.notes.joinedSteps(); joined > 0)
+        lines.push_back(std::to_string(joined) + " trims that cancel out within " +
+                        counted(static_cast<std::size_t>(m_document.simplify), "frame") + " are joined");
+    addDoubts(false, lines);
+    addDoubts(true, lines);
+    return lines;
+}
+
+void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
+{
+    const core::Programme& cut = isNew ? m_document.notes.newCut() : m_document.notes.oldCut();
+    std::array<std::size_t, DoubtWords.size()> counts{};
+    for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
+        const EventBase& event = cut.events().at(static_cast<std::size_t>(doubtful.event));
+        if (++counts.at(static_cast<std::size_t>(doubtful.doubt)) <= MostOfOneDoubt)
+            lines.push_back(concatenated({toPrintable(event.edlFileName(), MostCharactersOfAName).text, ", event ",
+                                          std::to_string(event.eventNumber()), " (", nameOf(&event),
+                                          "): ", explanationOf(doubtful.doubt)}));
+    }
+    for (std::size_t doubt = 0; doubt < counts.size(); ++doubt) {
+        if (counts[doubt] > MostOfOneDoubt)
+            lines.push_back(concatenated({isNew ? "New cut, " : "Old cut, ",
+                                          counted(counts[doubt] - MostOfOneDoubt, "further event"), ": ",
+                                          explanationOf(static_cast<PictureDoubt>(doubt))}));
+    }
+}
+
+std::string NotesWording::cutText(bool isNew) const
+{
+    return describeEvents(isNew ? m_document.newEvents : m_document.oldEvents,
+                          isNew ? m_document.cuts.newNames : m_document.cuts.oldNames);
+}
+
+std::string NotesWording::nameOf(const EventBase* shot)
+{
+    if (shot == nullptr)
+        return "no picture";
+    return toPrintable(shot->clipName().empty() ? shot->rollName() : shot->clipName(), MostCharactersOfAName).text;
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "app/notes/NotesDocument.h"
+
+#include <cstdint>
+#include <initializer_list>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace cadrel::app {
+
+/// The words for a ChangeKind, a StepAction, a PictureDoubt and an EventFlaw in files for other programs.
+std::string_view wordOf(core::ChangeKind kind);
+std::string_view wordOf(core::StepAction action);
+std::string_view wordOf(core::PictureDoubt doubt);
+std::string_view wordOfFlaw(std::int32_t flaw);
+
+/// The texts one after the other.
+std::string concatenated(std::initializer_list<std::string_view> texts);
+
+/// What a change does, and to which shot.
+struct ChangeWords {
+    std::string what; ///< "tail -20 frames"
+    std::string shot; ///< "42A-3 MAREN MCU"
+    std::string more; ///< "roll A012C007, source 10:00:00:00"; mostly empty
+};
+
+/// Says in words what stands in the notes.
+class NotesWording {
+public:
+    explicit NotesWording(const NotesDocument& document) : m_document(document) {}
+
+    /// Of a frame count. It begins anew after 24 hours, which a reel may reach on its way to a shorter one.
+    std::string timecode(std::int32_t frames) const;
+    /// A length with its sign.
+    std::string change(std::int32_t frames) const;
+    /// 35 mm feet and frames, 16 frames a foot: "12+05". The first frame of a reel is 0+00.
+    static std::string feet(std::int32_t frames);
+
+    /// Where a row stands in the programme as it is then. Of a move to further on it is where the picture is taken from.
+    core::WorkPlace placeOf(const core::NoteEntry& entry, std::size_t reel) const;
+    /// "delete 00:00:01:00".
+    std::string action(const core::NoteEntry& entry) const;
+    ChangeWords describe(const core::PictureChange& change) const;
+    /// The change of a step that stands for it where there is room for one.
+    static const core::PictureChange& largestChange(const core::NoteEntry& entry);
+    /// Feet and frames of the row, counted inclusively: "at 12+05 delete through 13+04"; empty for a kept stretch.
+    std::string inFeet(const core::NoteEntry& entry) const;
+    /// "Reel 1, 03:00:00:00".
+    std::string reelTitle(std::size_t reel) const;
+    /// "00:15:30:21 before, 00:15:07:20 after, -00:00:23:01".
+    std::string reelLengths(std::size_t reel) const;
+    /// What was healed, joined, doubted and passed over, a line each.
+    std::vector<std::string> remarks() const;
+    /// The names of the files of a cut, its number of events and of flawed ones.
+    std::string cutText(bool isNew) const;
+
+    /// The clip's name, or the roll's where it has none; "no picture" for a gap.
+    static std::string nameOf(const core::EventBase* shot);
+
+    const NotesDocument& document() const { return m_document; }
+
+private:
+    std::string transitionText(const core::PictureChange& change) const;
+    void addDoubts(bool isNew, std::vector<std::string>& lines) const;
+
+    const NotesDocument& m_document;
+};
+
+} // namespace cadrel::app

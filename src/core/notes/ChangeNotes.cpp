@@ -1,0 +1,148 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notes/ChangeNotes.h"
+
+#include "core/edl/HealedEvent.h"
+#include "core/notes/KeptStretches.h"
+#include "core/notes/StepMaker.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace cadrel::core {
+
+namespace {
+
+std::int32_t lengthOf(const Programme& programme, const std::optional<std::size_t>& reel)
+{
+    return reel ? programme.reels()[*reel].length : 0;
+}
+
+} // namespace
+
+ChangeNotes::ChangeNotes(const EventList& oldEvents, const EventList& newEvents, const PictureRules& rules,
+                         std::int32_t simplify)
+    : m_framerate(rules.framerate), m_oldCut(oldEvents, rules, m_numbers), m_newCut(newEvents, rules, m_numbers)
+{
+    const std::vector<KeptStretch> kept = findKeptStretches(m_oldCut, m_newCut);
+    StepList list = makeSteps(m_oldCut, m_newCut, kept);
+    for (std::size_t reel = 0; reel < list.reels.size(); ++reel) {
+        joinTrims(list.rows[reel], simplify);
+        ReelNotes notes;
+        notes.pair = list.reels[reel];
+        notes.before = lengthOf(m_oldCut, notes.pair.oldReel);
+        notes.after = lengthOf(m_newCut, notes.pair.newReel);
+        for (NoteRow& row : list.rows[reel])
+            notes.entries.push_back({std::move(row)});
+        m_reels.push_back(std::move(notes));
+    }
+    number();
+    count(kept);
+}
+
+/// Numbers the steps and adds up what each reel wins and loses.
+void ChangeNotes::number()
+{
+    std::vector<std::int32_t> offsets(m_reels.size(), 0);
+    for (std::size_t reel = 0; reel < m_reels.size(); ++reel) {
+        for (NoteEntry& entry : m_reels[reel].entries) {
+            if (const NoteStep* const step = entry.step()) {
+                entry.number = ++m_totals.steps;
+                entry.lengthChange = step->lengthChange();
+                if (step->action == StepAction::Move && step->from.reel != step->place.reel) {
+                    const std::size_t other = step->from.reel == reel ? step->place.reel : step->from.reel;
+                    entry.lengthChange = step->place.reel == reel ? step->moved : -step->moved;
+                    offsets[other] -= entry.lengthChange;
+                }
+                offsets[reel] += entry.lengthChange;
+                m_totals.moved += step->moved;
+            }
+            entry.runningOffset = offsets[reel];
+        }
+    }
+}
+
+void ChangeNotes::count(const std::vector<KeptStretch>& kept)
+{
+    m_totals.before = m_oldCut.length();
+    m_totals.after = m_newCut.length();
+    for (const KeptStretch& stretch : kept)
+        (stretch.isDoubled ? m_totals.doubled : m_totals.kept) += stretch.length;
+    m_totals.lifted = m_totals.before - m_totals.kept;
+    m_totals.inserted = m_totals.after - m_totals.kept - m_totals.doubled;
+}
+
+std::vector<const NoteEntry*> ChangeNotes::largestSteps() const
+{
+    std::vector<const NoteEntry*> steps;
+    for (const ReelNotes& reel : m_reels) {
+        for (const NoteEntry& entry : reel.entries) {
+            if (entry.step() != nullptr)
+                steps.push_back(&entry);
+        }
+    }
+    const auto end = steps.begin() + static_cast<std::ptrdiff_t>(std::min(steps.size(), LargestCount));
+    std::partial_sort(steps.begin(), end, steps.end(), [](const NoteEntry* a, const NoteEntry* b) {
+        return std::pair(-extentOf(*a->step()), a->number) < std::pair(-extentOf(*b->step()), b->number);
+    });
+    steps.erase(end, steps.end());
+    return steps;
+}
+
+std::size_t ChangeNotes::joinedSteps() const
+{
+    std::size_t joined = 0;
+    for (const ReelNotes& reel : m_reels) {
+        for (const NoteEntry& entry : reel.entries)
+            joined += entry.step() != nullptr && entry.step()->joined > 1 ? entry.step()->joined : 0;
+    }
+    return joined;
+}
+
+std::int32_t ChangeNotes::timecodeOf(const WorkPlace& place) const
+{
+    const ReelPair& pair = m_reels[place.reel].pair;
+    const Reel& reel = pair.newReel ? m_newCut.reels()[*pair.newReel] : m_oldCut.reels()[*pair.oldReel];
+    return reel.timecodeStart + place.frame;
+}
+
+std::int32_t ChangeNotes::oldTimecode(std::int32_t frame) const
+{
+    return m_oldCut.timecodeOf(frame, m_oldCut.reelAt(frame));
+}
+
+std::int32_t ChangeNotes::newTimecode(std::int32_t frame) const
+{
+    return m_newCut.timecodeOf(frame, m_newCut.reelAt(frame));
+}
+
+HealingNotes notesOfHealing(const EventList& changeEdl)
+{
+    HealingNotes notes;
+    for (const auto& event : changeEdl.events()) {
+        const auto* const healed = dynamic_cast<const HealedEvent*>(event.get());
+        if (healed == nullptr)
+            continue;
+        const auto& members = healed->healedEvents().events();
+        ++notes.events;
+        notes.members += members.size();
+        for (std::size_t member = 1; member < members.size(); ++member)
+            notes.bridgedGaps += members[member - 1]->dstOut() < members[member]->dstIn() ? 1U : 0U;
+    }
+    return notes;
+}
+
+std::int32_t extentOf(const NoteStep& step)
+{
+    switch (step.action) {
+    case StepAction::Move:
+        return step.moved;
+    case StepAction::Relabel:
+        return 0; // the picture stays where it is
+    case StepAction::Replace:
+        break;
+    }
+    return std::max(step.removed, step.inserted.length);
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,96 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/edl/EventList.h"
+#include "core/notes/NoteStep.h"
+#include "core/notes/PictureRules.h"
+#include "core/notes/Programme.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <vector>
+
+namespace cadrel::core {
+
+/// Frames, and steps. Kept and lifted picture make the old length; kept, doubled and inserted picture the new one.
+struct NoteTotals {
+    std::int32_t before = 0; ///< length in the old cut
+    std::int32_t after = 0;
+    std::int32_t kept = 0;
+    std::int32_t lifted = 0;
+    std::int32_t inserted = 0;
+    std::int32_t doubled = 0;
+    std::int32_t moved = 0; ///< by all moves
+    std::size_t steps = 0;
+};
+
+struct NoteEntry {
+    NoteRow row;
+    std::size_t number = 0;         ///< of a step, from 1 through all reels; 0 for a kept stretch
+    std::int32_t lengthChange = 0;  ///< what the reel wins by the step; a move between reels counts for both
+    std::int32_t runningOffset = 0; ///< the sum of these changes with this one; of a kept stretch that before it
+
+    const NoteStep* step() const { return std::get_if<NoteStep>(&row); }
+    const KeptStretch* kept() const { return std::get_if<KeptStretch>(&row); }
+};
+
+struct ReelNotes {
+    ReelPair pair;
+    std::int32_t before = 0;
+    std::int32_t after = 0;
+    std::vector<NoteEntry> entries;
+};
+
+/// How the change EDL was healed.
+struct HealingNotes {
+    std::size_t events = 0;      ///< healed events
+    std::size_t members = 0;     ///< what they stand for
+    std::size_t bridgedGaps = 0; ///< gaps between members, which the healed events cover
+};
+
+/// What has changed between two cuts of a film, as steps that turn the old cut into the new one by hand, reel by reel.
+class ChangeNotes {
+public:
+    static constexpr std::size_t LargestCount = 10;
+
+    /// The lists outlive the notes. Trims that cancel out within `simplify` frames are joined; 0 joins none.
+    ChangeNotes(const EventList& oldEvents, const EventList& newEvents, const PictureRules& rules,
+                std::int32_t simplify = 0);
+
+    const Programme& oldCut() const { return m_oldCut; }
+    const Programme& newCut() const { return m_newCut; }
+    const Framerate& framerate() const { return m_framerate; }
+    const std::vector<ReelNotes>& reels() const { return m_reels; }
+    const NoteTotals& totals() const { return m_totals; }
+    /// The steps that change the most frames, the largest first.
+    std::vector<const NoteEntry*> largestSteps() const;
+    /// How many steps were joined into others.
+    std::size_t joinedSteps() const;
+
+    /// The frame count of the timecode of a place in the programme as it is at a step: counted from the start of the new
+    /// reel, or the old one where it is gone.
+    std::int32_t timecodeOf(const WorkPlace& place) const;
+    /// Of a frame of the old or the new programme.
+    std::int32_t oldTimecode(std::int32_t frame) const;
+    std::int32_t newTimecode(std::int32_t frame) const;
+
+private:
+    void number();
+    void count(const std::vector<KeptStretch>& kept);
+
+    Framerate m_framerate;
+    TextNumbers m_numbers;
+    Programme m_oldCut;
+    Programme m_newCut;
+    std::vector<ReelNotes> m_reels;
+    NoteTotals m_totals;
+};
+
+HealingNotes notesOfHealing(const EventList& changeEdl);
+
+/// How much picture a step changes, in frames.
+std::int32_t extentOf(const NoteStep& step);
+
+} // namespace cadrel::core

@@ -1,0 +1,106 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notes/EventPicture.h"
+
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/edl/MatchedName.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace cadrel::core {
+
+namespace {
+
+constexpr double FreezeSpeed = 0.0;
+
+/// Separates the parts of a material's text; no name of an EDL holds it.
+constexpr char Separator = '\n';
+
+std::string materialText(const std::string& kind, std::initializer_list<std::string> parts)
+{
+    std::string text = kind;
+    for (const std::string& part : parts)
+        text += Separator + part;
+    return text;
+}
+
+std::string timesOf(const EventBase& event)
+{
+    return event.srcIn().toString() + " " + event.srcOut().toString();
+}
+
+/// The event of the outgoing side: a transition's two lines share their number.
+const EventBase* outgoingOf(const EventList& events, std::size_t index)
+{
+    if (index == 0 || events.at(index - 1).eventNumber() != events.at(index).eventNumber())
+        return nullptr;
+    return &events.at(index - 1);
+}
+
+} // namespace
+
+EventPicture::EventPicture(const EventList& events, std::size_t index, const PictureRules& rules, TextNumbers& numbers)
+    : m_event(static_cast<std::int32_t>(index))
+{
+    const EventBase& event = events.at(index);
+    const std::string& name = nameBy(rules.matchBy, event);
+    const std::string key = rules.versions.stripVersion(name);
+    const std::int32_t version = numbers.numberOf(materialText("version", {name}));
+
+    if (!event.isValid()) {
+        const std::string text = materialText("flawed", {event.rollName(), event.clipName(), timesOf(event),
+                                                         std::to_string(event.transitionType()),
+                                                         std::to_string(event.transitionDuration())});
+        m_body = {numbers.numberOf(text), version, 0.0, 1.0};
+        return;
+    }
+    const double srcIn = event.srcIn().toFrameCount(rules.framerate);
+    const double speed = event.motionSpeed();
+    if (EventBase::areSameSpeed(speed, FreezeSpeed))
+        m_body = {numbers.numberOf(materialText("freeze", {key, event.srcIn().toString()})), version, 0.0, 1.0};
+    else
+        m_body = {numbers.numberOf(materialText("clip", {key})), version, srcIn, event.isNormalSpeed() ? 1.0 : speed};
+    if (!event.isTransition() || event.transitionDuration() <= 0)
+        return;
+
+    const EventBase* const outgoing = outgoingOf(events, index);
+    const std::string outgoingName = outgoing == nullptr ? std::string() : nameBy(rules.matchBy, *outgoing);
+    const std::string text =
+        materialText("transition", {std::to_string(event.transitionType()), std::to_string(event.transitionDuration()),
+                                    key, event.srcIn().toString(), std::to_string(std::lround(speed * 100)),
+                                    rules.versions.stripVersion(outgoingName),
+                                    outgoing == nullptr ? std::string() : outgoing->srcOut().toString()});
+    m_transition = {numbers.numberOf(text), numbers.numberOf(materialText("version", {name, outgoingName})), 0.0, 1.0};
+    m_transitionLength = std::min(event.transitionDuration(), event.dstOut().toFrameCount(rules.framerate) -
+                                                                  event.dstIn().toFrameCount(rules.framerate));
+}
+
+PictureRun EventPicture::runFrom(std::int32_t from) const
+{
+    const bool isTransition = from < transitionLength();
+    const Material& material = isTransition ? *m_transition : m_body;
+    return {.start = 0,
+            .length = 0,
+            .material = material.number,
+            .version = material.version,
+            .source = material.source + from * material.sourceStep,
+            .sourceStep = material.sourceStep,
+            .event = m_event,
+            .isTransition = isTransition};
+}
+
+bool hasPlace(const EventBase& event, const Framerate& framerate)
+{
+    return event.dstIn().isInitialized() && event.dstOut().isInitialized() && event.dstIn().isValid(framerate) &&
+           event.dstOut().isValid(framerate) && event.dstIn() < event.dstOut() &&
+           !event.hasFlaw(EventFlaw::NotVideoEvent);
+}
+
+bool tellsNothing(const std::string& name)
+{
+    return name.empty() || name == "AX";
+}
+
+} // namespace cadrel::core

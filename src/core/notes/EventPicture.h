@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/notes/Programme.h"
+
+namespace cadrel::core {
+
+/// What an event shows, before it is known which part of it is seen.
+class EventPicture {
+public:
+    /// For the event at `index`, which has a place in the programme.
+    EventPicture(const EventList& events, std::size_t index, const PictureRules& rules, TextNumbers& numbers);
+
+    /// Where its transition ends, from its first frame; 0 without one.
+    std::int32_t transitionLength() const { return m_transition ? m_transitionLength : 0; }
+    /// What is seen of the transition, or of the rest, from the frame `from` of the event. `start` and `length` are left
+    /// to the caller.
+    PictureRun runFrom(std::int32_t from) const;
+
+private:
+    struct Material {
+        std::int32_t number;
+        std::int32_t version;
+        double source; ///< in frame 0 of the event
+        double sourceStep;
+    };
+
+    std::int32_t m_event;
+    Material m_body;
+    std::optional<Material> m_transition;
+    std::int32_t m_transitionLength = 0;
+};
+
+/// Whether the event takes a place in the programme.
+bool hasPlace(const EventBase& event, const Framerate& framerate);
+
+/// Whether a name tells nothing of the material.
+bool tellsNothing(const std::string& name);
+
+} // namespace cadrel::core

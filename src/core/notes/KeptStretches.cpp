@@ -1,0 +1,159 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notes/KeptStretches.h"
+
+#include "core/notes/Programme.h"
+#include "core/notes/SharedChain.h"
+#include "core/notes/SharedPicture.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <queue>
+#include <tuple>
+
+namespace cadrel::core {
+
+namespace {
+
+/// Gives the frames of the new programme to those of the old one, one choice after the other.
+class Assignment {
+public:
+    Assignment(const Programme& oldCut, const Programme& newCut) : m_oldCut(oldCut), m_newCut(newCut)
+    {
+        const SharedPictureSearch search(oldCut);
+        for (std::size_t index = 0; index < newCut.runs().size(); ++index) {
+            const auto found = search.sharedWith(newCut.runs()[index], index);
+            m_shared.insert(m_shared.end(), found.begin(), found.end());
+        }
+    }
+
+    std::vector<KeptStretch> make()
+    {
+        for (const SharedPicture& stretch : longestChain(m_shared))
+            keep(stretch.oldStart, stretch.newStart, stretch.length, false);
+        keepLongest(false);
+        keepLongest(true);
+        return joined();
+    }
+
+private:
+    struct Offer {
+        std::int32_t length; ///< at most so many frames are free
+        std::int32_t newStart;
+        std::int32_t oldStart;
+        std::size_t shared;
+
+        /// The longest comes first, of equal ones the earliest.
+        bool operator<(const Offer& other) const
+        {
+            return std::tie(length, other.newStart, other.oldStart) < std::tie(other.length, newStart, oldStart);
+        }
+    };
+
+    void keep(std::int32_t oldStart, std::int32_t newStart, std::int32_t length, bool isDoubled)
+    {
+        m_takenNew.take(newStart, newStart + length);
+        if (!isDoubled)
+            m_takenOld.take(oldStart, oldStart + length);
+        m_kept.push_back({oldStart, newStart, length, isDoubled});
+    }
+
+    /// The longest part of a shared stretch whose frames are free; of length 0 when there is none.
+    Offer offerOf(std::size_t index, bool isDoubled) const
+    {
+        const SharedPicture& shared = m_shared[index];
+        const std::int32_t shift = shared.oldStart - shared.newStart;
+        Offer longest{0, shared.newStart, shared.oldStart, index};
+        for (std::int32_t frame = shared.newStart; frame < shared.newEnd();) {
+            const std::int32_t freeInNew = m_takenNew.nextFree(frame);
+            const std::int32_t free =
+                isDoubled ? freeInNew : std::max(freeInNew, m_takenOld.nextFree(frame + shift) - shift);
+            if (free != frame) {
+                frame = free;
+                continue;
+            }
+            std::int32_t end = m_takenNew.nextTaken(frame, shared.newEnd());
+            if (!isDoubled)
+                end = m_takenOld.nextTaken(frame + shift, end + shift) - shift;
+            if (end - frame > longest.length)
+                longest = {end - frame, frame, frame + shift, index};
+            frame = end;
+        }
+        return longest;
+    }
+
+    /// Keeps the longest free stretch again and again, until nothing is free.
+    void keepLongest(bool isDoubled)
+    {
+        std::priority_queue<Offer> offers;
+        const auto offer = [&](std::size_t index) {
+            const Offer made = offerOf(index, isDoubled);
+            if (made.length > 0)
+                offers.push(made);
+        };
+        for (std::size_t index = 0; index < m_shared.size(); ++index) {
+            if (!m_newCut.runs()[m_shared[index].newRun].isGap())
+                offer(index);
+        }
+        while (!offers.empty()) {
+            const Offer best = offers.top();
+            offers.pop();
+            const Offer now = offerOf(best.shared, isDoubled);
+            if (now.length == best.length && now.newStart == best.newStart)
+                keep(now.oldStart, now.newStart, now.length, isDoubled);
+            offer(best.shared);
+        }
+    }
+
+    std::vector<KeptStretch> joined()
+    {
+        std::sort(m_kept.begin(), m_kept.end(),
+                  [](const KeptStretch& a, const KeptStretch& b) { return a.newStart < b.newStart; });
+        std::vector<KeptStretch> stretches;
+        for (std::size_t index = 0; index < m_kept.size(); ++index) {
+            const KeptStretch& kept = m_kept[index];
+            if (isLongerEnd(index))
+                continue;
+            if (!stretches.empty() && goesOn(stretches.back(), kept))
+                stretches.back().length += kept.length;
+            else
+                stretches.push_back(kept);
+        }
+        return stretches;
+    }
+
+    /// Whether a doubled stretch only makes a kept shot longer, at its head or its tail.
+    bool isLongerEnd(std::size_t index) const
+    {
+        const KeptStretch& kept = m_kept[index];
+        const auto isOfOneShot = [this](const KeptStretch& before, const KeptStretch& after) {
+            return before.isDoubled != after.isDoubled && before.newEnd() == after.newStart &&
+                   m_newCut.runAt(before.newStart + before.length - 1) == m_newCut.runAt(after.newStart);
+        };
+        return kept.isDoubled && ((index > 0 && isOfOneShot(m_kept[index - 1], kept)) ||
+                                  (index + 1 < m_kept.size() && isOfOneShot(kept, m_kept[index + 1])));
+    }
+
+    bool goesOn(const KeptStretch& before, const KeptStretch& kept) const
+    {
+        return before.isDoubled == kept.isDoubled && before.newEnd() == kept.newStart &&
+               before.oldEnd() == kept.oldStart && m_newCut.reelAt(before.newStart) == m_newCut.reelAt(kept.newStart) &&
+               m_oldCut.reelAt(before.oldStart) == m_oldCut.reelAt(kept.oldStart);
+    }
+
+    const Programme& m_oldCut;
+    const Programme& m_newCut;
+    std::vector<SharedPicture> m_shared;
+    TakenFrames m_takenOld;
+    TakenFrames m_takenNew;
+    std::vector<KeptStretch> m_kept;
+};
+
+} // namespace
+
+std::vector<KeptStretch> findKeptStretches(const Programme& oldCut, const Programme& newCut)
+{
+    return Assignment(oldCut, newCut).make();
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,145 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notes/SharedChain.h"
+
+#include "core/notes/PrefixTrees.h"
+
+#include <algorithm>
+#include <limits>
+#include <unordered_map>
+#include <utility>
+
+namespace cadrel::core {
+
+namespace {
+
+constexpr std::size_t None = std::numeric_limits<std::size_t>::max();
+/// Of the uses of one old run so many are looked at for an overlap.
+constexpr std::size_t MostUsesLookedAt = 32;
+
+/// The worth of a chain, and its last stretch. A frame is worth more than all the ends that there can be.
+struct Chain {
+    static constexpr std::int64_t FrameWorth = std::int64_t{1} << 24;
+    static constexpr std::int64_t EndWorth = -1;
+
+    std::int64_t worth = 0;
+    std::size_t last = None;
+
+    bool operator<(const Chain& other) const { return worth < other.worth; }
+};
+
+class ChainSearch {
+public:
+    explicit ChainSearch(const std::vector<SharedPicture>& shared)
+        : m_shared(shared), m_chains(shared.size()), m_before(shared.size(), None), m_byOldEnd(shared.size(), Chain())
+    {
+        for (const SharedPicture& stretch : shared)
+            m_oldEnds.push_back(stretch.oldEnd());
+        std::sort(m_oldEnds.begin(), m_oldEnds.end());
+    }
+
+    std::vector<SharedPicture> find()
+    {
+        for (std::size_t first = 0; first < m_shared.size();) {
+            std::size_t end = first;
+            while (end < m_shared.size() && m_shared[end].newRun == m_shared[first].newRun)
+                ++end;
+            for (std::size_t index = first; index < end; ++index)
+                chainUp(index, first);
+            for (std::size_t index = first; index < end; ++index)
+                enter(index);
+            first = end;
+        }
+        return take();
+    }
+
+private:
+    /// `firstOfRun`: the first stretch of the same new run.
+    void chainUp(std::size_t index, std::size_t firstOfRun)
+    {
+        const SharedPicture& stretch = m_shared[index];
+        const auto ended = std::upper_bound(m_oldEnds.begin(), m_oldEnds.end(), stretch.oldStart) - m_oldEnds.begin();
+        Chain best = m_byOldEnd.ofFirst(static_cast<std::size_t>(ended));
+        best.worth += Chain::EndWorth;
+        const auto consider = [&](std::size_t before) {
+            const SharedPicture& earlier = m_shared[before];
+            if (earlier.oldStart >= stretch.oldStart || earlier.newStart >= stretch.newStart ||
+                earlier.oldEnd() >= stretch.oldEnd() || earlier.newEnd() >= stretch.newEnd())
+                return;
+            const std::int32_t overlap =
+                std::max({0, earlier.oldEnd() - stretch.oldStart, earlier.newEnd() - stretch.newStart});
+            const bool goesOn = earlier.oldEnd() == stretch.oldStart && earlier.newEnd() == stretch.newStart;
+            const Chain chain{m_chains[before].worth - overlap * Chain::FrameWorth + (goesOn ? 0 : Chain::EndWorth),
+                              before};
+            if (overlap < stretch.length && best < chain)
+                best = chain;
+        };
+        if (const auto joined = m_byEnds.find(endsKey(stretch.oldStart, stretch.newStart)); joined != m_byEnds.end())
+            consider(joined->second);
+        for (std::size_t before = firstOfRun; before < index; ++before)
+            consider(before);
+        if (const auto uses = m_usesOfOldRun.find(stretch.oldRun); uses != m_usesOfOldRun.end()) {
+            const auto& all = uses->second;
+            for (std::size_t use = all.size() - std::min(all.size(), MostUsesLookedAt); use < all.size(); ++use)
+                consider(all[use]);
+        }
+        m_before[index] = best.last;
+        m_chains[index] = {best.worth + stretch.length * Chain::FrameWorth, index};
+    }
+
+    void enter(std::size_t index)
+    {
+        const SharedPicture& stretch = m_shared[index];
+        const auto place = std::lower_bound(m_oldEnds.begin(), m_oldEnds.end(), stretch.oldEnd()) - m_oldEnds.begin();
+        m_byOldEnd.raise(static_cast<std::size_t>(place), m_chains[index]);
+        m_usesOfOldRun[stretch.oldRun].push_back(index);
+        const auto [joined, isNew] = m_byEnds.try_emplace(endsKey(stretch.oldEnd(), stretch.newEnd()), index);
+        if (!isNew && m_chains[joined->second] < m_chains[index])
+            joined->second = index;
+    }
+
+    std::vector<SharedPicture> take() const
+    {
+        Chain best;
+        for (const Chain& chain : m_chains) {
+            if (best < chain)
+                best = chain;
+        }
+        std::vector<SharedPicture> chain;
+        for (std::size_t index = best.last; index != None; index = m_before[index])
+            chain.push_back(m_shared[index]);
+        std::reverse(chain.begin(), chain.end());
+        for (std::size_t index = 1; index < chain.size(); ++index) {
+            const SharedPicture& before = chain[index - 1];
+            SharedPicture& stretch = chain[index];
+            const std::int32_t overlap =
+                std::max({0, before.oldEnd() - stretch.oldStart, before.newEnd() - stretch.newStart});
+            stretch.oldStart += overlap;
+            stretch.newStart += overlap;
+            stretch.length -= overlap;
+        }
+        return chain;
+    }
+
+    static std::int64_t endsKey(std::int32_t oldEnd, std::int32_t newEnd)
+    {
+        return (std::int64_t{oldEnd} << 32) | newEnd;
+    }
+
+    const std::vector<SharedPicture>& m_shared;
+    std::vector<Chain> m_chains;       ///< the best that ends with each stretch
+    std::vector<std::size_t> m_before; ///< the stretch before it in that chain
+    std::vector<std::int32_t> m_oldEnds;
+    PrefixMaximum<Chain> m_byOldEnd;
+    std::unordered_map<std::int64_t, std::size_t> m_byEnds;
+    std::unordered_map<std::size_t, std::vector<std::size_t>> m_usesOfOldRun;
+};
+
+} // namespace
+
+std::vector<SharedPicture> longestChain(const std::vector<SharedPicture>& shared)
+{
+    return ChainSearch(shared).find();
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,363 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "tests/app/Film.h"
+#include "tests/app/JsonSchema.h"
+#include "tests/app/ProgramRun.h"
+#include "tests/support/TreePaths.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+#include <sstream>
+
+namespace {
+
+using namespace cadrel::tests;
+using nlohmann::json;
+
+std::vector<std::string> linesOf(const std::string& text)
+{
+    std::vector<std::string> lines;
+    std::istringstream stream(text);
+    for (std::string line; std::getline(stream, line);)
+        lines.push_back(line);
+    return lines;
+}
+
+/// An old and a new cut in a folder of their own.
+class Cuts {
+public:
+    Cuts(const std::string& oldText, const std::string& newText)
+        : m_old(folder.write("old.edl", oldText)), m_new(folder.write("new.edl", newText))
+    {
+    }
+
+    Outcome notes(const std::vector<std::string>& more = {}) const
+    {
+        std::vector<std::string> arguments{"notes", "--old", m_old, "--new", m_new};
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        return runCadrel(arguments);
+    }
+
+    /// The notes in the form of that extension.
+    std::string file(const std::string& extension, std::vector<std::string> more = {}) const
+    {
+        const std::string path = folder / ("notes" + extension);
+        more.insert(more.end(), {"-o", path});
+        const Outcome outcome = notes(more);
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        EXPECT_EQ(outcome.out, "");
+        return contentOf(path);
+    }
+
+    const TempFolder folder;
+
+private:
+    const std::string m_old;
+    const std::string m_new;
+};
+
+std::vector<std::string> reel3(std::vector<std::string> more)
+{
+    std::vector<std::string> arguments{"notes",
+                                       "--old",
+                                       treePath("examples/reel3/reel3_v07.edl"),
+                                       "--new",
+                                       treePath("examples/reel3/reel3_v12.edl"),
+                                       "--vfx",
+                                       "VFX_****_v,_comp"};
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    return arguments;
+}
+
+json reel3Json()
+{
+    const TempFolder folder;
+    const std::string path = folder / "notes.json";
+    const Outcome outcome = runCadrel(reel3({"-o", path}));
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    return json::parse(contentOf(path));
+}
+
+TEST(Notes, ShowsTheStepsAsText)
+{
+    const Cuts film(oldCut(), newCut());
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    const std::string steps = "Reel 1, 01:00:00:00\n"
+                              "00:00:30:00 before, 00:00:32:00 after, +00:00:02:00\n"
+                              "\n"
+                              "step  at           what to do                                length       offset\n"
+                              "      01:00:00:00  kept 00:00:10:00, was 01:00:00:00                 00:00:00:00\n"
+                              "   1  01:00:10:00  delete 00:00:02:00                  -00:00:02:00 -00:00:02:00\n"
+                              "      head -48 frames                    TWO\n"
+                              "      01:00:10:00  kept 00:00:08:00, was 01:00:12:00                -00:00:02:00\n"
+                              "   2  01:00:18:00  insert 00:00:04:00                  +00:00:04:00 +00:00:02:00\n"
+                              "      inserted 00:00:04:00               NEW\n"
+                              "        roll B009, source 05:00:00:00\n"
+                              "      01:00:22:00  kept 00:00:10:00, was 01:00:20:00                +00:00:02:00\n";
+    EXPECT_NE(outcome.out.find(steps), std::string::npos) << outcome.out;
+}
+
+TEST(Notes, NoLineOfTheTextIsWiderThan80Columns)
+{
+    const Outcome outcome = runCadrel(reel3({"--feet"}));
+
+    for (const std::string& line : linesOf(outcome.out))
+        EXPECT_LE(line.size(), 80U) << line;
+}
+
+TEST(Notes, LongNamesMakeNoLineWider)
+{
+    const std::string name(60, 'N');
+    const auto shot = [&name](const char* number, const char* roll, const char* source, const char* place) {
+        return cut(number, roll, source, place) + clipName(name);
+    };
+    const Cuts film(shot("001", "A001", "10:00:00:00 10:00:09:12", "01:00:00:00 01:00:09:12") +
+                        shot("002", "A002", "10:00:00:00 10:00:01:00", "01:00:09:12 01:00:10:12") +
+                        shot("003", "A003", "10:00:00:00 10:00:01:00", "01:00:10:12 01:00:11:12"),
+                    shot("001", "A002", "10:00:00:00 10:00:01:00", "01:00:00:00 01:00:01:00") +
+                        shot("002", "A003", "10:00:00:00 10:00:01:00", "01:00:01:00 01:00:02:00") +
+                        shot("003", "A001", "10:00:00:00 10:00:09:12", "01:00:02:00 01:00:11:12") +
+                        shot("004", "A009", "10:00:00:00 10:00:09:12", "01:00:11:12 01:00:21:00"));
+
+    const Outcome outcome = film.notes({"--feet"});
+
+    EXPECT_NE(outcome.out.find(" and 1 more"), std::string::npos) << outcome.out;
+    for (const std::string& line : linesOf(outcome.out)) {
+        // The sign that a name goes on has three bytes.
+        const auto cutNames = std::count(line.begin(), line.end(), '\xE2');
+        EXPECT_LE(static_cast<std::ptrdiff_t>(line.size()) - 2 * cutNames, 80) << line;
+    }
+}
+
+TEST(Notes, FeetCountTheLastFrameIn)
+{
+    const Cuts film(oldCut(), newCut());
+
+    const Outcome outcome = film.notes({"--feet"});
+
+    // 10 s are 240 frames, 15 feet; 48 frames are 3 feet, and the last of them is frame 287, 17 feet and 15 frames.
+    EXPECT_NE(outcome.out.find("      delete 15+00 through 17+15\n"), std::string::npos) << outcome.out;
+    // 18 s are 432 frames, 27 feet; 4 s are 96 frames, 6 feet.
+    EXPECT_NE(outcome.out.find("      insert 27+00 through 32+15\n"), std::string::npos) << outcome.out;
+}
+
+TEST(Notes, TheCsvHasARowAStepAndFixedColumns)
+{
+    const Cuts film(oldCut(), newCut());
+
+    EXPECT_EQ(film.file(".csv"),
+              "\xEF\xBB\xBFstep,reel,action,at,from,delete,insert,move,delete_frames,insert_frames,move_frames,"
+              "length_change_frames,offset_frames,kinds,roll,clip,old_in,new_in,changes,at_feet,from_feet\r\n"
+              "1,1,replace,01:00:10:00,,00:00:02:00,,,48,0,0,-48,-48,head-trimmed,A002,TWO,01:00:10:00,,"
+              "TWO: head -48 frames,15+00,\r\n"
+              "2,1,replace,01:00:18:00,,,00:00:04:00,,0,96,0,96,48,inserted,B009,NEW,,01:00:18:00,"
+              "\"NEW: inserted 00:00:04:00, roll B009, source 05:00:00:00\",27+00,\r\n");
+}
+
+TEST(Notes, ACsvTextIsNoFormulaAndKeepsItsQuotes)
+{
+    const Cuts film(cut("001", "A001", "10:00:00:12 10:00:10:00", "01:00:00:00 01:00:09:12"),
+                    cut("001", "A001", "10:00:00:12 10:00:10:00", "01:00:00:00 01:00:09:12") +
+                        cut("002", "B002", "10:00:00:00 10:00:01:00", "01:00:09:12 01:00:10:12") +
+                        clipName("=1+\"A\""));
+
+    const std::string csv = film.file(".csv");
+
+    EXPECT_NE(csv.find(",B002,\"'=1+\"\"A\"\"\","), std::string::npos) << csv;
+}
+
+TEST(Notes, TheJsonKeepsToItsSchema)
+{
+    const JsonSchema schema(json::parse(contentOf(treePath("docs/notes.schema.json"))));
+    const Cuts film(oldCut(), newCut());
+
+    EXPECT_EQ(schema.faultOf(json::parse(film.file(".json", {"--feet"}))), "");
+    EXPECT_EQ(schema.faultOf(reel3Json()), "");
+}
+
+TEST(Notes, TheSchemaRefusesWhatIsNoNotes)
+{
+    const JsonSchema schema(json::parse(contentOf(treePath("docs/notes.schema.json"))));
+    json notes = reel3Json();
+
+    json missing = notes;
+    missing.erase("rate");
+    json surplus = notes;
+    surplus["more"] = 1;
+    json number = notes;
+    number["reels"][0]["rows"][1]["action"] = 0;
+
+    for (const json& wrong : {missing, surplus, number})
+        EXPECT_NE(schema.faultOf(wrong), "");
+}
+
+TEST(Notes, TheFiguresOfTheExampleAreThoseOfItsListOfChanges)
+{
+    const json notes = reel3Json();
+    const json& totals = notes.at("totals");
+
+    // 00:15:30:21 and 00:15:07:20 at 24 frames a second, as the page of the example says.
+    EXPECT_EQ(totals.at("framesBefore"), (15 * 60 + 30) * 24 + 21);
+    EXPECT_EQ(totals.at("framesAfter"), (15 * 60 + 7) * 24 + 20);
+    EXPECT_EQ(totals.at("reels"), 1);
+    // The second wide of the weir, 3:12.
+    EXPECT_EQ(totals.at("doubledFrames"), 3 * 24 + 12);
+    EXPECT_EQ(totals.at("framesBefore"), totals.at("keptFrames").get<int>() + totals.at("liftedFrames").get<int>());
+    EXPECT_EQ(totals.at("framesAfter"), totals.at("keptFrames").get<int>() + totals.at("doubledFrames").get<int>() +
+                                            totals.at("insertedFrames").get<int>());
+
+    int moves = 0;
+    std::vector<std::string> versions;
+    int change = 0;
+    for (const json& row : notes.at("reels")[0].at("rows")) {
+        if (row.at("row") == "kept")
+            continue;
+        change += row.at("lengthChangeFrames").get<int>();
+        moves += row.at("action") == "move" ? 1 : 0;
+        if (row.at("action") == "relabel")
+            versions.push_back(row.at("changes")[0].at("newShot").at("roll"));
+    }
+    EXPECT_EQ(change, -(23 * 24 + 1)); // -23:01
+    EXPECT_EQ(moves, 2);               // scene 46, and the men on the barge deck
+    EXPECT_EQ(versions, (std::vector<std::string>{"VFX_0310_v012_comp", "VFX_0320_v009_comp", "VFX_0330_v006_comp",
+                                                  "VFX_0340_v011_comp", "VFX_0410_v010_comp", "VFX_0420_v008_comp",
+                                                  "VFX_0440_v005_comp", "VFX_0450_v013_comp"}));
+}
+
+TEST(Notes, ThePictureThatIsKeptIsWhatTheChangeEdlCovers)
+{
+    const TempFolder folder;
+    const std::string path = folder / "change.json";
+    std::vector<std::string> arguments = reel3({"--json", path});
+    arguments[0] = "generate";
+    ASSERT_EQ(runCadrel(arguments).status, 0);
+    const json change = json::parse(contentOf(path));
+    const json totals = reel3Json().at("totals");
+
+    // The change EDL knows no freeze frames: the photograph of 72 frames is kept in the notes alone.
+    EXPECT_EQ(totals.at("keptFrames").get<int>() + totals.at("doubledFrames").get<int>(),
+              change.at("coveredFrames").get<int>() + 72);
+}
+
+TEST(Notes, ThePageLoadsNothingAndHasALineForEachStep)
+{
+    const TempFolder folder;
+    const std::string path = folder / "notes.HTML";
+    ASSERT_EQ(runCadrel(reel3({"-o", path})).status, 0);
+    const std::string page = contentOf(path);
+
+    EXPECT_NE(page.find("default-src 'none'"), std::string::npos);
+    for (const char* const loading : {"http://", "https://", "src=", "@import", "url(", "<link"})
+        EXPECT_EQ(page.find(loading), std::string::npos) << loading;
+    const auto steps = reel3Json().at("totals").at("steps").get<int>();
+    for (int step = 1; step <= steps; ++step)
+        EXPECT_NE(page.find("<tr id=\"s" + std::to_string(step) + "\""), std::string::npos) << step;
+    EXPECT_EQ(page.find("<tr id=\"s" + std::to_string(steps + 1) + "\""), std::string::npos);
+}
+
+/// How often a text stands in another.
+int countOf(const std::string& part, const std::string& text)
+{
+    int count = 0;
+    for (std::size_t at = text.find(part); at != std::string::npos; at = text.find(part, at + 1))
+        ++count;
+    return count;
+}
+
+TEST(Notes, ThePdfHasThePaperThatIsAskedFor)
+{
+    const TempFolder folder;
+    ASSERT_EQ(runCadrel(reel3({"-o", folder / "a4.pdf"})).status, 0);
+    ASSERT_EQ(runCadrel(reel3({"--paper", "letter", "-o", folder / "letter.pdf"})).status, 0);
+
+    const std::string a4 = contentOf(folder / "a4.pdf");
+    const std::string letter = contentOf(folder / "letter.pdf");
+
+    EXPECT_TRUE(a4.starts_with("%PDF-"));
+    EXPECT_GT(countOf("/MediaBox [ 0 0 595.28", a4), 1);
+    EXPECT_GT(countOf("/MediaBox [ 0 0 612 792 ]", letter), 1);
+}
+
+TEST(Notes, ANameThatIsNoUtf8CantBreakThePdf)
+{
+    const Cuts film(oldCut(), newCut() + clipName("\xFF\xFE (x) \\"));
+
+    EXPECT_TRUE(film.file(".pdf").starts_with("%PDF-"));
+}
+
+TEST(Notes, ANameCantBreakThePage)
+{
+    const Cuts film(oldCut(), newCut() + clipName("<script>\"&"));
+
+    const std::string page = film.file(".html");
+
+    EXPECT_EQ(page.find("<script>\"&"), std::string::npos);
+}
+
+TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
+{
+    std::string sound;
+    for (int event = 4; event < 11; ++event)
+        sound += "010  S001  A  C  10:00:00:00 10:00:01:00 01:00:00:00 01:00:01:00\n";
+    const Cuts film(oldCut() + sound, oldCut());
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(countOf("old.edl, event 10 (S001): no picture", outcome.out), 5) << outcome.out;
+    EXPECT_NE(outcome.out.find("Old cut, 2 further events: no picture"), std::string::npos) << outcome.out;
+}
+
+TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
+{
+    // 20 s of new picture come first, so that the last shot is at 00:00:10:00 when it is to be moved.
+    const Cuts film(cut("001", "A001", "10:00:00:12 10:00:30:12", "23:59:10:00 23:59:40:00") +
+                        cut("002", "A002", "10:00:00:00 10:00:10:00", "23:59:40:00 23:59:50:00") +
+                        cut("003", "A003", "10:00:00:00 10:00:05:00", "23:59:50:00 23:59:55:00"),
+                    cut("001", "N001", "10:00:00:00 10:00:20:00", "23:59:10:00 23:59:30:00") +
+                        cut("002", "A003", "10:00:00:00 10:00:05:00", "23:59:30:00 23:59:35:00") +
+                        cut("003", "A001", "10:00:00:12 10:00:20:12", "23:59:35:00 23:59:55:00"));
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_NE(outcome.out.find("move 00:00:05:00 from 00:00:10:00"), std::string::npos) << outcome.out;
+}
+
+TEST(Notes, ACutHasNothingToTellOfItself)
+{
+    const Cuts film(oldCut(), oldCut());
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_NE(outcome.out.find("\nNothing has changed.\n"), std::string::npos) << outcome.out;
+}
+
+TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)
+{
+    const Cuts film(oldCut(), cut("001", "Z001", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00"));
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_NE(outcome.out.find("   1  01:00:00:00  replace 00:00:30:00 by 00:00:10:00"), std::string::npos)
+        << outcome.out;
+}
+
+TEST(Notes, RefusesAFormThatItDoesNotKnow)
+{
+    const Cuts film(oldCut(), newCut());
+
+    const Outcome outcome = film.notes({"-o", film.folder / "notes.doc"});
+
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_NE(outcome.err.find(".html, .pdf, .csv, .txt or .json"), std::string::npos) << outcome.err;
+}
+
+} // namespace

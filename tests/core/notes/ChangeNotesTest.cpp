@@ -1,0 +1,487 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notes/ChangeNotes.h"
+#include "core/edl/EventBase.h"
+#include "core/notes/StayingBlocks.h"
+#include "tests/support/core/TestProject.h"
+
+#include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
+
+#include <algorithm>
+#include <memory>
+#include <numeric>
+#include <string>
+#include <vector>
+
+namespace cadrel::tests {
+namespace {
+
+using namespace core;
+
+constexpr int Hour = 90000; // frames at 25 frames a second
+
+/// A shot in frames; the next stands right after it.
+struct Shot {
+    std::string roll;
+    int srcIn = 0;
+    int length = 0;
+    int srcLength = -1; ///< -1: the length
+    int dissolve = 0;   ///< frames
+};
+
+std::shared_ptr<EventBase> eventOf(const Shot& shot, int dstIn, unsigned number)
+{
+    auto event = std::make_shared<EventBase>();
+    event->setRollName(shot.roll);
+    event->setEventNumber(number);
+    const int srcLength = shot.srcLength < 0 ? shot.length : shot.srcLength;
+    event->setTimecodes(Timecode(shot.srcIn), Timecode(shot.srcIn + srcLength), Timecode(dstIn),
+                        Timecode(dstIn + shot.length));
+    if (shot.dissolve > 0) {
+        event->setTransitionType(TransitionType::Dissolve);
+        event->setTransitionDuration(shot.dissolve);
+    }
+    return event;
+}
+
+EventList reelOf(const std::vector<Shot>& shots, int start = Hour)
+{
+    EventList events;
+    for (const Shot& shot : shots) {
+        events.add(eventOf(shot, start, static_cast<unsigned>(events.size()) + 1));
+        start += shot.length;
+    }
+    return events;
+}
+
+std::string rollOf(std::size_t number)
+{
+    return std::string("R").append(std::to_string(number));
+}
+
+/// The notes of two cuts at 25 frames a second.
+class Notes {
+public:
+    Notes(EventList oldList, EventList newList, int simplify = 0, const std::string& vfxPrefix = {})
+        : oldCut(std::move(oldList)), newCut(std::move(newList)), notes(oldCut, newCut, rulesOf(vfxPrefix), simplify)
+    {
+    }
+
+    std::vector<NoteStep> steps() const
+    {
+        std::vector<NoteStep> found;
+        for (const ReelNotes& reel : notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                if (entry.step() != nullptr)
+                    found.push_back(*entry.step());
+            }
+        }
+        return found;
+    }
+
+    static PictureRules rulesOf(const std::string& vfxPrefix)
+    {
+        PictureRules rules{Framerate(25, 0), MatchBy::RollName, {}};
+        if (!vfxPrefix.empty())
+            rules.versions.compile({{vfxPrefix, ""}});
+        return rules;
+    }
+
+    const EventList oldCut;
+    const EventList newCut;
+    const ChangeNotes notes;
+};
+
+/// "delete 5 at 10: TailTrimmed -5" of each step.
+std::string textOf(const PictureChange& change)
+{
+    static const char* const Words[] = {"head",     "tail",          "lifted",         "inserted",
+                                        "replaced", "moved",         "doubled",        "retimed",
+                                        "version",  "transition in", "transition out", "transition"};
+    return std::string(Words[static_cast<int>(change.kind)]) + " " + std::to_string(change.frames);
+}
+
+std::string textOf(const NoteStep& step)
+{
+    std::string text;
+    switch (step.action) {
+    case StepAction::Replace:
+        text.append("-").append(std::to_string(step.removed));
+        text.append(" +").append(std::to_string(step.inserted.length));
+        break;
+    case StepAction::Move:
+        text = std::to_string(step.moved) + " from " + std::to_string(step.from.frame);
+        break;
+    case StepAction::Relabel:
+        text = std::to_string(step.inserted.length) + " again";
+        break;
+    }
+    text.append(" at ").append(std::to_string(step.place.frame)).append(":");
+    for (const PictureChange& change : step.changes)
+        text.append(" ").append(textOf(change)).append(";");
+    return text;
+}
+
+std::vector<std::string> textOf(const std::vector<NoteStep>& steps)
+{
+    std::vector<std::string> texts;
+    for (const NoteStep& step : steps)
+        texts.push_back(textOf(step));
+    return texts;
+}
+
+using Texts = std::vector<std::string>;
+
+class ChangeNotesTest : public testing::Test {
+    const TestProject m_project;
+};
+
+TEST_F(ChangeNotesTest, AShortenedTailIsOneStepThere)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}}), reelOf({{"A", 0, 80}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-20 +0 at 80: tail -20;"});
+}
+
+TEST_F(ChangeNotesTest, ALengthenedHeadIsOneStepThere)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 30, 50}}), reelOf({{"A", 0, 100}, {"B", 20, 60}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-0 +10 at 100: head 10;"});
+}
+
+TEST_F(ChangeNotesTest, ARolledCutIsOneStepWithoutAChangeOfLength)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 30, 50}}), reelOf({{"A", 0, 109}, {"B", 39, 41}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-9 +9 at 100: tail 9; head -9;"});
+    EXPECT_EQ(film.steps()[0].lengthChange(), 0);
+}
+
+TEST_F(ChangeNotesTest, AShotReplacedByOneOfEqualLengthIsOneChange)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 10}}),
+                     reelOf({{"A", 0, 100}, {"X", 0, 50}, {"C", 0, 10}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-50 +50 at 100: replaced 50;"});
+}
+
+TEST_F(ChangeNotesTest, AShotReplacedByALongerOneIsALiftAndAnInsertInOneStep)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 10}}),
+                     reelOf({{"A", 0, 100}, {"X", 0, 51}, {"C", 0, 10}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-50 +51 at 100: lifted 50; inserted 51;"});
+}
+
+TEST_F(ChangeNotesTest, AShotCutIntoAnotherIsOneInsert)
+{
+    const Notes film(reelOf({{"A", 0, 100}}), reelOf({{"A", 0, 40}, {"X", 0, 25}, {"A", 40, 60}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-0 +25 at 40: inserted 25;"});
+}
+
+TEST_F(ChangeNotesTest, APartOutOfTheMiddleOfAShotIsALift)
+{
+    const Notes film(reelOf({{"A", 0, 100}}), reelOf({{"A", 0, 40}, {"A", 60, 40}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-20 +0 at 40: lifted 20;"});
+    EXPECT_TRUE(film.steps()[0].changes[0].isPart);
+}
+
+TEST_F(ChangeNotesTest, AnAddEditIsNoStep)
+{
+    const Notes film(reelOf({{"A", 0, 100}}), reelOf({{"A", 0, 40}, {"A", 40, 60}}));
+
+    EXPECT_TRUE(film.steps().empty());
+}
+
+TEST_F(ChangeNotesTest, AShotThatMovesForwardIsOneStepWithItsNewPlaceFirst)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 30}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 30}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"30 from 150 at 100: moved 30;"});
+}
+
+TEST_F(ChangeNotesTest, ALongerShotStaysAndTheShorterMovesBehindIt)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 30}, {"C", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 50}, {"B", 0, 30}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"30 from 100 at 150: moved 30;"});
+}
+
+TEST_F(ChangeNotesTest, ASceneMovesAsOneAndIsTrimmedAtItsNewPlace)
+{
+    const Notes film(reelOf({{"A", 0, 500}, {"B", 0, 50}, {"C", 0, 50}, {"D", 0, 50}}),
+                     reelOf({{"B", 0, 50}, {"C", 0, 40}, {"D", 0, 50}, {"A", 0, 500}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"150 from 500 at 0: moved 150;", "-10 +0 at 90: tail -10;"}));
+}
+
+TEST_F(ChangeNotesTest, AShotMovesOutFromBetweenShotsThatGoInOneStepAndTheyGoInAnother)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"X", 0, 8}, {"B", 0, 30}, {"Y", 0, 9}, {"C", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 50}, {"B", 0, 30}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"30 from 108 at 167: moved 30;", "-17 +0 at 100: lifted 8; lifted 9;"}));
+}
+
+TEST_F(ChangeNotesTest, WhatGoesBeforeAShotThatMovesOutGoesFirst)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"X", 0, 8}, {"B", 0, 30}, {"C", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 50}, {"B", 0, 30}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"-8 +0 at 100: lifted 8;", "30 from 100 at 150: moved 30;"}));
+}
+
+TEST_F(ChangeNotesTest, OldShotsGoInTheStepThatInsertsNewOnes)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"X", 0, 8}, {"C", 0, 50}, {"B", 0, 30}}),
+                     reelOf({{"A", 0, 100}, {"B", 0, 30}, {"N", 0, 9}, {"C", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"30 from 158 at 100: moved 30;", "-8 +9 at 130: lifted 8; inserted 9;"}));
+}
+
+TEST_F(ChangeNotesTest, ADoubledShotTellsWhereItStandsAsWell)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}}), reelOf({{"A", 0, 100}, {"B", 0, 50}, {"A", 20, 30}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-0 +30 at 150: doubled 30;"});
+    ASSERT_EQ(film.steps()[0].doubledFrom.size(), 1U);
+    EXPECT_EQ(film.steps()[0].doubledFrom[0], (WorkPlace{0, 20}));
+}
+
+TEST_F(ChangeNotesTest, AnotherSpeedIsARetime)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 10}}),
+                     reelOf({{"A", 0, 100}, {"B", 0, 25, 50}, {"C", 0, 10}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-50 +25 at 100: retimed 25;"});
+}
+
+TEST_F(ChangeNotesTest, AnotherVersionOfAVfxShotIsAStepThatMovesNothing)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"VFX_1", 0, 50}}), reelOf({{"A", 0, 100}, {"VFX_2", 0, 50}}), 0, "VFX_");
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"50 again at 100: version 50;"});
+}
+
+TEST_F(ChangeNotesTest, ADissolveInThePlaceOfACutIsOneChange)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}}), reelOf({{"A", 0, 100}, {"B", 0, 50, -1, 12}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-12 +12 at 100: transition in 12;"});
+}
+
+TEST_F(ChangeNotesTest, AShorterDissolveAtTheSameCentreIsOneChange)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 90, -1, 48}}), reelOf({{"A", 0, 112}, {"B", 12, 78, -1, 24}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-48 +48 at 100: transition 24;"});
+}
+
+TEST_F(ChangeNotesTest, TheShotsOfANewDissolveMeetInItsMiddle)
+{
+    // A loses 40 frames and is followed by a dissolve of 12, which B begins 6 frames earlier for.
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 20, 50}}), reelOf({{"A", 0, 54}, {"B", 14, 56, -1, 12}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-52 +12 at 54: transition in 12; tail -40;"});
+}
+
+TEST_F(ChangeNotesTest, AFreezeIsKeptAndItsEndIsTrimmed)
+{
+    const Notes film(reelOf({{"A", 0, 100, 0}, {"B", 0, 50}}), reelOf({{"A", 0, 72, 0}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-28 +0 at 72: tail -28;"});
+}
+
+TEST_F(ChangeNotesTest, TheSecondUseOfAShotStaysTheSecondAlsoWhereItHasBecomeLonger)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}, {"A", 50, 30}, {"C", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"B", 0, 50}, {"A", 50, 40}, {"C", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-0 +10 at 180: tail 10;"});
+}
+
+TEST_F(ChangeNotesTest, TrimsThatCancelOutWithinSoManyFramesAreOneStep)
+{
+    const EventList oldCut = reelOf({{"A", 0, 100}, {"B", 0, 40}, {"C", 10, 50}});
+    const EventList newCut = reelOf({{"A", 0, 95}, {"B", 0, 40}, {"C", 5, 55}});
+
+    EXPECT_EQ(Notes(oldCut, newCut, 39).steps().size(), 2U);
+    const Notes film(oldCut, newCut, 40);
+    EXPECT_EQ(textOf(film.steps()), Texts{"-45 +45 at 95: tail -5; head 5;"});
+    EXPECT_EQ(film.notes.joinedSteps(), 2U);
+}
+
+TEST_F(ChangeNotesTest, TrimsThatLeaveAFrameAreNotJoined)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 40}, {"C", 10, 50}}),
+                     reelOf({{"A", 0, 95}, {"B", 0, 40}, {"C", 6, 54}}), 1000);
+
+    EXPECT_EQ(film.steps().size(), 2U);
+}
+
+TEST_F(ChangeNotesTest, AChangeInOneReelLeavesTheNextWhereItIs)
+{
+    EventList oldCut = reelOf({{"A", 0, 100}});
+    oldCut.append(reelOf({{"B", 0, 100}, {"C", 0, 50}}, 2 * Hour));
+    EventList newCut = reelOf({{"A", 0, 90}});
+    newCut.append(reelOf({{"B", 0, 100}, {"X", 0, 7}, {"C", 0, 50}}, 2 * Hour));
+    const Notes film(oldCut, newCut);
+
+    ASSERT_EQ(film.notes.reels().size(), 2U);
+    EXPECT_EQ(textOf(film.steps()), (Texts{"-10 +0 at 90: tail -10;", "-0 +7 at 100: inserted 7;"}));
+    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].place), 2 * Hour + 100);
+    EXPECT_EQ(film.notes.reels()[1].entries.front().runningOffset, 0);
+}
+
+TEST_F(ChangeNotesTest, AMinuteWithoutPictureBeginsAReelAndAFrameLessDoesNot)
+{
+    EventList apart = reelOf({{"A", 0, 100}});
+    apart.append(reelOf({{"B", 0, 100}}, Hour + 100 + 60 * 25));
+    EventList together = reelOf({{"A", 0, 100}});
+    together.append(reelOf({{"B", 0, 100}}, Hour + 100 + 60 * 25 - 1));
+
+    EXPECT_EQ(Notes(apart, apart).notes.reels().size(), 2U);
+    EXPECT_EQ(Notes(together, together).notes.reels().size(), 1U);
+}
+
+TEST_F(ChangeNotesTest, AShotThatGoesToAnotherReelIsTakenOutOfItsOwn)
+{
+    EventList oldCut = reelOf({{"A", 0, 100}, {"M", 0, 20}});
+    oldCut.append(reelOf({{"B", 0, 100}}, 2 * Hour));
+    EventList newCut = reelOf({{"A", 0, 100}});
+    newCut.append(reelOf({{"B", 0, 100}, {"M", 0, 20}}, 2 * Hour));
+    const Notes film(oldCut, newCut);
+
+    const auto steps = film.steps();
+    ASSERT_EQ(steps.size(), 1U);
+    EXPECT_EQ(steps[0].from, (WorkPlace{0, 100}));
+    EXPECT_EQ(steps[0].place, (WorkPlace{1, 100}));
+    EXPECT_EQ(film.notes.reels()[0].entries.back().runningOffset, -20);
+    EXPECT_EQ(film.notes.reels()[1].entries.back().runningOffset, 20);
+}
+
+TEST_F(ChangeNotesTest, TheTotalsAreThoseOfTheSteps)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 30}, {"C", 0, 50}, {"D", 0, 8}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 50}, {"B", 0, 30}, {"X", 0, 9}, {"A", 10, 5}}));
+    const NoteTotals& totals = film.notes.totals();
+
+    EXPECT_EQ(totals.before, 188);
+    EXPECT_EQ(totals.after, 194);
+    EXPECT_EQ(totals.kept, 180);
+    EXPECT_EQ(totals.lifted, 8);
+    EXPECT_EQ(totals.inserted, 9);
+    EXPECT_EQ(totals.doubled, 5);
+    EXPECT_EQ(totals.moved, 30);
+    EXPECT_EQ(totals.steps, 2U);
+}
+
+TEST_F(ChangeNotesTest, TheTenLargestStepsComeWithTheLargestFirst)
+{
+    std::vector<Shot> oldShots;
+    std::vector<Shot> newShots;
+    for (int shot = 0; shot < 12; ++shot) {
+        const std::string roll = rollOf(static_cast<std::size_t>(shot));
+        oldShots.push_back({roll, 0, 100});
+        newShots.push_back({roll, 0, 99 - shot});
+    }
+    const Notes film(reelOf(oldShots), reelOf(newShots));
+
+    std::vector<std::int32_t> extents;
+    for (const NoteEntry* const entry : film.notes.largestSteps())
+        extents.push_back(extentOf(*entry->step()));
+
+    EXPECT_EQ(extents, (std::vector<std::int32_t>{12, 11, 10, 9, 8, 7, 6, 5, 4, 3}));
+}
+
+TEST_F(ChangeNotesTest, WhatCantBeTrustedIsDoubted)
+{
+    EventList oldCut = reelOf({{"A", 0, 100}, {"", 0, 10}, {"B", 0, 10}, {"C", 0, 10}, {"D", 0, 10}});
+    oldCut.at(2).setSrc(Timecode(50), Timecode(40));
+    oldCut.at(3).addFlaw(EventFlaw::NotVideoEvent);
+    oldCut.at(4).addFlaw(EventFlaw::RollNameInvalid);
+    oldCut.add(eventOf({"E", 0, 5}, Hour + 10, 9));
+    const Notes film(oldCut, oldCut);
+
+    std::vector<std::pair<PictureDoubt, std::int32_t>> doubts;
+    for (const DoubtfulEvent& doubtful : film.notes.oldCut().doubts())
+        doubts.emplace_back(doubtful.doubt, doubtful.event);
+
+    using enum PictureDoubt;
+    const decltype(doubts) expected{{Covered, 0}, {Nameless, 1}, {Reversed, 2}, {NoPicture, 3}, {Flawed, 4}};
+    EXPECT_EQ(doubts, expected);
+    EXPECT_TRUE(film.steps().empty());
+}
+
+TEST_F(ChangeNotesTest, TwoEmptyListsHaveNothingToTell)
+{
+    const Notes film{EventList(), EventList()};
+
+    EXPECT_TRUE(film.notes.reels().empty());
+    EXPECT_TRUE(film.notes.largestSteps().empty());
+}
+
+TEST_F(ChangeNotesTest, AnEmptyCutBecomesAFilmInOneInsert)
+{
+    const Notes film(EventList(), reelOf({{"A", 0, 100}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-0 +150 at 0: inserted 100; inserted 50;"});
+}
+
+/// The fewest moves that bring shots in this order, looked for in all choices of what stays; of those the fewest frames.
+std::pair<int, int> fewestMoves(const std::vector<std::size_t>& order, const std::vector<int>& lengths)
+{
+    std::pair<int, int> fewest{1000, 0};
+    for (unsigned choice = 0; choice < 1U << order.size(); ++choice) {
+        std::pair<int, int> moves{0, 0};
+        std::size_t next = 0;
+        bool rises = true;
+        for (std::size_t place = 0; place < order.size(); ++place) {
+            if ((choice >> place & 1U) == 0) {
+                ++moves.first;
+                moves.second += lengths[order[place]];
+                continue;
+            }
+            rises = rises && order[place] >= next;
+            next = order[place];
+        }
+        if (rises)
+            fewest = std::min(fewest, moves);
+    }
+    return fewest;
+}
+
+RC_GTEST_PROP(ChangeNotesLaw, NoChoiceOfWhatStaysHasFewerMovesOrFrames, ())
+{
+    const auto count = *rc::gen::inRange<std::size_t>(1, 8);
+    const auto lengths = *rc::gen::container<std::vector<int>>(count, rc::gen::inRange(1, 20));
+    std::vector<std::size_t> order(count);
+    std::iota(order.begin(), order.end(), std::size_t{0});
+    for (std::size_t place = count - 1; place > 0; --place)
+        std::swap(order[place], order[*rc::gen::inRange<std::size_t>(0, place + 1)]);
+    // Neighbours that stay together are one shot here, since they move as one.
+    for (std::size_t place = 1; place < count; ++place)
+        RC_PRE(order[place] != order[place - 1] + 1);
+    const TestProject project;
+    std::vector<Shot> oldShots;
+    std::vector<Shot> newShots;
+    for (std::size_t shot = 0; shot < count; ++shot)
+        oldShots.push_back({rollOf(shot), 0, lengths[shot]});
+    for (const std::size_t shot : order)
+        newShots.push_back(oldShots[shot]);
+
+    const Notes film(reelOf(oldShots), reelOf(newShots));
+
+    const auto [moves, frames] = fewestMoves(order, lengths);
+    RC_ASSERT(film.notes.totals().steps == static_cast<std::size_t>(moves));
+    RC_ASSERT(film.notes.totals().moved == frames);
+}
+
+} // namespace
+} // namespace cadrel::tests

@@ -1,0 +1,195 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notes/ChangeNotes.h"
+#include "core/notes/KeptStretches.h"
+#include "core/notes/StepMaker.h"
+#include "tests/core/notes/NotesPlayer.h"
+#include "tests/core/notes/RandomRecut.h"
+#include "tests/support/TreePaths.h"
+#include "tests/support/core/TestProject.h"
+
+#include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <string>
+#include <vector>
+
+namespace cadrel::tests {
+namespace {
+
+using namespace core;
+
+/// The steps from one list to the other, with the trims joined that cancel out within `simplify` frames.
+StepList stepsBetween(const EventList& oldCut, const EventList& newCut, const PictureRules& rules, int simplify = 0)
+{
+    TextNumbers numbers;
+    const Programme oldProgramme(oldCut, rules, numbers);
+    const Programme newProgramme(newCut, rules, numbers);
+    StepList list = makeSteps(oldProgramme, newProgramme, findKeptStretches(oldProgramme, newProgramme));
+    for (auto& rows : list.rows)
+        joinTrims(rows, simplify);
+    return list;
+}
+
+std::size_t countSteps(const StepList& list)
+{
+    std::size_t count = 0;
+    for (const auto& rows : list.rows)
+        count += static_cast<std::size_t>(std::count_if(
+            rows.begin(), rows.end(), [](const NoteRow& row) { return std::holds_alternative<NoteStep>(row); }));
+    return count;
+}
+
+/// Carries all steps out. Empty when that gives the new cut, and when each step is told about; else what is wrong.
+std::string playAll(const EventList& oldCut, const EventList& newCut, const PictureRules& rules, const StepList& list)
+{
+    NotesPlayer player(oldCut, newCut, rules, list.reels);
+    for (const auto& rows : list.rows) {
+        for (const NoteRow& row : rows) {
+            const auto* const step = std::get_if<NoteStep>(&row);
+            if (step == nullptr)
+                continue;
+            if (step->changes.empty())
+                return "a step tells of no change";
+            if (step->action == StepAction::Replace && !player.isDoneBefore(step->place))
+                return "what lies before a step isn't done";
+            std::size_t doubled = 0;
+            for (const PictureChange& change : step->changes) {
+                if (change.kind == ChangeKind::Doubled &&
+                    !player.showsAt(step->doubledFrom.at(doubled++), change.inNew->start))
+                    return "what is doubled stands elsewhere";
+            }
+            player.carryOut(*step);
+        }
+    }
+    return player.difference();
+}
+
+RC_GTEST_PROP(NotesLaw, TheStepsTurnTheOldCutIntoTheNewOne, ())
+{
+    const auto seed = *genRecutSeed();
+    const RandomRecut film(seed);
+    const TestProject project(film.rules.framerate);
+
+    const StepList list = stepsBetween(film.oldCut, film.newCut, film.rules);
+
+    const std::string wrong = playAll(film.oldCut, film.newCut, film.rules, list);
+    RC_LOG() << wrong;
+    RC_ASSERT(wrong.empty());
+}
+
+RC_GTEST_PROP(NotesLaw, JoinedTrimsTurnTheOldCutIntoTheNewOneToo, ())
+{
+    const auto seed = *genRecutSeed();
+    const int simplify = *rc::gen::inRange(1, 400);
+    const RandomRecut film(seed);
+    const TestProject project(film.rules.framerate);
+
+    const StepList list = stepsBetween(film.oldCut, film.newCut, film.rules, simplify);
+
+    const std::string wrong = playAll(film.oldCut, film.newCut, film.rules, list);
+    RC_LOG() << wrong;
+    RC_ASSERT(wrong.empty());
+    RC_ASSERT(countSteps(list) <= countSteps(stepsBetween(film.oldCut, film.newCut, film.rules)));
+}
+
+RC_GTEST_PROP(NotesLaw, ACutHasNoStepsToItself, ())
+{
+    const auto seed = *genRecutSeed();
+    const RandomRecut film(seed);
+    const TestProject project(film.rules.framerate);
+
+    RC_ASSERT(countSteps(stepsBetween(film.oldCut, film.oldCut, film.rules)) == 0U);
+    RC_ASSERT(countSteps(stepsBetween(film.newCut, film.newCut, film.rules)) == 0U);
+}
+
+RC_GTEST_PROP(NotesLaw, TheOffsetsEndInTheChangeOfLength, ())
+{
+    const auto seed = *genRecutSeed();
+    const RandomRecut film(seed);
+    const TestProject project(film.rules.framerate);
+
+    const ChangeNotes notes(film.oldCut, film.newCut, film.rules);
+
+    const NoteTotals& totals = notes.totals();
+    RC_ASSERT(totals.kept + totals.lifted == totals.before);
+    RC_ASSERT(totals.kept + totals.doubled + totals.inserted == totals.after);
+    for (const ReelNotes& reel : notes.reels()) {
+        if (!reel.entries.empty())
+            RC_ASSERT(reel.entries.back().runningOffset == reel.after - reel.before);
+    }
+}
+
+/// The EDLs of the tree.
+std::vector<std::string> edlsOfTheTree()
+{
+    std::vector<std::string> files;
+    for (const char* const folder : {"tests/data/edl", "examples/reel3"}) {
+        for (const auto& entry : std::filesystem::directory_iterator(treePath(folder))) {
+            if (entry.path().extension() == ".edl" || entry.path().extension() == ".txt")
+                files.push_back(entry.path().string());
+        }
+    }
+    std::sort(files.begin(), files.end());
+    return files;
+}
+
+EventList loaded(const std::string& file)
+{
+    EventList events;
+    events.load(std::filesystem::path(file).wstring(), false);
+    return events;
+}
+
+/// The rules at the rate of the project.
+PictureRules plainRules(const TestProject& project)
+{
+    return {project.framerate, MatchBy::RollName, {}};
+}
+
+TEST(NotesOfRealEdls, NoEdlHasAStepToItself)
+{
+    const auto files = edlsOfTheTree();
+    ASSERT_GT(files.size(), 30U);
+
+    for (const std::string& file : files) {
+        const TestProject project(Framerate(30, 0));
+        const EventList events = loaded(file);
+
+        EXPECT_EQ(countSteps(stepsBetween(events, events, plainRules(project))), 0U) << file;
+    }
+}
+
+TEST(NotesOfRealEdls, EachEdlBecomesEachOther)
+{
+    const TestProject project(Framerate(30, 0));
+    const PictureRules rules = plainRules(project);
+    std::vector<EventList> lists;
+    for (const std::string& file : edlsOfTheTree())
+        lists.push_back(loaded(file));
+
+    for (std::size_t from = 0; from < lists.size(); ++from) {
+        for (std::size_t to = 0; to < lists.size(); ++to)
+            EXPECT_EQ(playAll(lists[from], lists[to], rules, stepsBetween(lists[from], lists[to], rules)), "")
+                << edlsOfTheTree()[from] << " to " << edlsOfTheTree()[to];
+    }
+}
+
+TEST(NotesOfRealEdls, EachEdlBecomesARecutOfItself)
+{
+    const TestProject project(Framerate(30, 0));
+    const PictureRules rules = plainRules(project);
+    for (const std::string& file : edlsOfTheTree()) {
+        const EventList events = loaded(file);
+        for (std::uint64_t seed = 1; seed <= 5; ++seed) {
+            const EventList recut = recutOf(events, rules.framerate, seed);
+
+            EXPECT_EQ(playAll(events, recut, rules, stepsBetween(events, recut, rules)), "") << file << ", " << seed;
+        }
+    }
+}
+
+} // namespace
+} // namespace cadrel::tests

@@ -1,0 +1,49 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/edl/EventList.h"
+#include "core/notes/NoteStep.h"
+#include "core/notes/PictureRules.h"
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace cadrel::tests {
+
+/// What is seen in one frame of a programme.
+struct SeenFrame {
+    std::string what;    ///< the material with its version, and what else tells it from others
+    double source = 0.0; ///< the frame of the material
+    double speed = 1.0;
+
+    /// Retimed shots may lie a frame apart, and what two speeds that count as one make over the length of a shot.
+    bool looksLike(const SeenFrame& other) const;
+};
+
+/// The frames of a programme, reel by reel. It is painted event by event and frame by frame.
+std::vector<std::vector<SeenFrame>> framesOf(const core::EventList& events, const core::PictureRules& rules);
+
+/// Carries steps out on the frames of the old cut as an assistant does it by hand, and looks up what has to be inserted in
+/// the new cut.
+class NotesPlayer {
+public:
+    NotesPlayer(const core::EventList& oldCut, const core::EventList& newCut, const core::PictureRules& rules,
+                const std::vector<core::ReelPair>& reels);
+
+    void carryOut(const core::NoteStep& step);
+    /// Empty when all reels are as in the new cut, else where they differ first.
+    std::string difference() const;
+    /// Whether the frames before a place are already those of the new cut.
+    bool isDoneBefore(const core::WorkPlace& place) const;
+    /// Whether the frames at a place look like those of the new cut from `newStart` on, whatever their version.
+    bool showsAt(const core::WorkPlace& place, int newStart) const;
+
+private:
+    std::vector<std::vector<SeenFrame>> m_goal; ///< by pairs of reels; empty for one that goes
+    std::vector<std::vector<SeenFrame>> m_reels;
+    std::vector<SeenFrame> m_newFrames;
+};
+
+} // namespace cadrel::tests
