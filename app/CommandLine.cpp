@@ -10,6 +10,7 @@
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
+#include <array>
 #include <cstdint>
 #include <iterator>
 #include <string>
@@ -46,7 +47,9 @@ Examples:
 
 constexpr const char* ApplyHelp =
     R"(Clips, automation and markers go where their picture went. Sound whose picture is gone is removed from the project,
-and a new shot has no sound yet. Locked tracks stay as they are. On tracks of its own in the folder "Cadrel
+and a new shot has no sound yet. What the new cut doesn't change isn't touched: leader, pops and tails go with their
+reel, and what is before the first change stays as it is. With --keep cut the change EDL alone counts, and all that it
+doesn't name is removed. Locked tracks stay as they are. On tracks of its own in the folder "Cadrel
 Markers", Cadrel marks where to look: each stretch that was carried over (Destination), new picture (Insert), new
 transitions (Dissolve/Wipe), jumps of the automation where two stretches meet (Automation Warning), slivers of clips
 at the end of one (Audio Snippet), and stretches that want the same place of a track (Overlap).
@@ -95,6 +98,9 @@ Examples:
   cadrel show reel3.stage --track "DIA 1"
   cadrel show reel3.stage --track Music --json -)";
 
+/// In the order of ApplyOptions::Keep.
+constexpr std::array<const char*, 2> KeepWords{"all", "cut"};
+
 constexpr const char* EventsJsonHelp = "Also write the events as JSON; - is standard output";
 constexpr const char* AllJsonHelp = "Also write it all as JSON; - is standard output";
 
@@ -132,6 +138,15 @@ void addRate(CLI::App& command, LoadOptions& load, const char* help)
     command.add_option("--rate", load.rateLabel, help)
         ->check(CLI::IsMember(wordList(ProjectFramerate::Labels)))
         ->type_name("LABEL");
+}
+
+void addShift(CLI::App& command, std::vector<std::string>& shifts)
+{
+    command
+        .add_option("--shift", shifts,
+                    "Move all timecodes of an EDL, such as --shift reel2.edl=+01:00:00:00; once for each file")
+        ->type_name("FILE=+TC")
+        ->allow_extra_args(false);
 }
 
 void addStrict(CLI::App& command, LoadOptions& load)
@@ -275,6 +290,7 @@ CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
     addOutput(*generate, "-o,--output", options.changeFile, "Where to write the change EDL");
     addOutput(*generate, "--json", options.jsonFile, EventsJsonHelp);
     addMatching(*generate, options.generation.settings);
+    addShift(*generate, options.generation.shifts);
     addLoadOptions(*generate, options.generation.load);
     generate->footer(GenerateHelp);
     return generate;
@@ -297,6 +313,17 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
     apply->add_flag("--in-place", options.inPlace, "Replace the project itself")->excludes("--output");
     addOutput(*apply, "--json", options.jsonFile, AllJsonHelp);
     apply->add_flag("--summary", options.summary, "Print the totals alone");
+    apply
+        ->add_option_function<std::string>(
+            "--keep",
+            [&options](const std::string& word) {
+                options.keep = static_cast<ApplyOptions::Keep>(numberOf(word, KeepWords));
+            },
+            "What stays where the cuts don't speak of a change: all (default), or what the change EDL says (cut)")
+        ->check(CLI::IsMember(wordList(KeepWords)))
+        ->type_name("WHAT");
+    apply->add_flag("--force", options.isForced, "Go on where the files don't seem to belong together");
+    addShift(*apply, options.generation.shifts);
     addRate(*apply, options.generation.load, "Stop when the project has another frame rate");
     addStrict(*apply, options.generation.load);
     apply->option_defaults()->group("Settings, stored with the project");
@@ -328,6 +355,7 @@ CLI::App* addNotes(CLI::App& program, NotesOptions& options)
         ->check(CLI::IsMember({"a4", "letter"}))
         ->type_name("SIZE");
     addMatching(*notes, options.generation.settings);
+    addShift(*notes, options.generation.shifts);
     addLoadOptions(*notes, options.generation.load);
     notes->footer(NotesHelp);
     return notes;
@@ -340,6 +368,7 @@ CLI::App* addList(CLI::App& program, ListOptions& options)
     list->add_flag("--audio", options.load.acceptAudio, "Accept audio events, as for a change EDL");
     list->add_flag("--summary", options.summary, "Print the totals alone");
     addOutput(*list, "--json", options.jsonFile, EventsJsonHelp);
+    addShift(*list, options.shifts);
     addLoadOptions(*list, options.load);
     list->footer(ListHelp);
     return list;

@@ -6,8 +6,11 @@
 #include "app/apply/ApplyJson.h"
 #include "app/apply/ApplyListing.h"
 #include "app/apply/HostedProject.h"
+#include "app/apply/KeptRun.h"
+#include "app/apply/Plausibility.h"
 #include "app/apply/ProgrammeShift.h"
 #include "app/apply/ProjectComparison.h"
+#include "app/apply/RunMaterial.h"
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
 #include "app/console/JsonOutput.h"
@@ -18,8 +21,11 @@
 #include "app/project/ProjectAccess.h"
 #include "app/project/ProjectClock.h"
 #include "core/edl/EventBase.h"
+#include "core/keep/ChangeStretch.h"
 #include "core/model/DataModel.h"
+#include "core/time/SecondsRange.h"
 #include "core/time/Timecode.h"
+#include "standin/base/Times.h"
 #include "standin/project/Project.h"
 
 #include <algorithm>
@@ -35,6 +41,8 @@ namespace cadrel::app {
 using core::DataModel;
 using core::EventBase;
 using core::EventFlaw;
+using core::EventList;
+using core::FrameRanges;
 using core::Framerate;
 using core::Settings;
 using core::Timecode;
@@ -99,6 +107,20 @@ void restrictRange(Settings& settings, const std::vector<std::string>& preserve)
     settings.setPreserveMaterial(before, after);
 }
 
+/// The EDLs of the run, in a message.
+std::string edlsOf(const ApplyOptions& options)
+{
+    return options.changeFiles.empty() ? joined(inputsOf(options.generation)) : joined(options.changeFiles);
+}
+
+/// Throws UsageError.
+FileShifts shiftsOf(const ApplyOptions& options)
+{
+    std::vector<std::string> files = inputsOf(options.generation);
+    files.insert(files.end(), options.changeFiles.begin(), options.changeFiles.end());
+    return {options.generation.shifts, files};
+}
+
 /// What the change EDL of the model was made of.
 struct ChangeSource {
     std::optional<Cuts> cuts; ///< nothing when it was given
@@ -114,17 +136,24 @@ ChangeSource fillChangeList(DataModel& model, const ApplyOptions& options, Termi
     GenerationOptions generation = options.generation;
     generation.load.renameBRolls = model.settings().bRollRenaming();
     generation.load.rateAdvice = "check the file and the frame rate of the project";
+    generation.load.refusesSameTimecodes = !options.isForced;
     if (options.changeFiles.empty())
         return {generateChangeEdl(model, generation, terminal), {}};
     generation.load.acceptAudio = true;
+    generation.load.shifts = shiftsOf(options);
+    generation.load.shiftedTimes = FileShifts::Times::Both;
     return {std::nullopt, loadEvents(EdlLoader(generation.load, terminal), options.changeFiles, model.changeEdl())};
 }
 
 /// The stretch of the new programme that a run may change, in seconds of the project's clock.
 struct Bounds {
-    explicit Bounds(const Settings& settings)
+    /// `kept` is null for a run that isn't planned.
+    Bounds(const Settings& settings, const KeptRun* kept)
     {
-        if (settings.restrictRange()) {
+        if (kept && kept->needsRun()) {
+            start = kept->bounds().start;
+            end = kept->bounds().end;
+        } else if (settings.restrictRange()) {
             start = settings.preserveMaterialBefore();
             end = settings.preserveMaterialAfter();
         }
@@ -153,7 +182,7 @@ std::string obstacleOf(const EventBase& event, const Framerate& framerate, const
 /// Throws Failure when nothing would be left to apply: such a run would only empty the tracks.
 std::vector<PassedOver> passedOver(const DataModel& model, const std::string& rateLabel, const ApplyOptions& options)
 {
-    const Bounds bounds(model.settings());
+    const Bounds bounds(model.settings(), nullptr);
     std::vector<PassedOver> passed;
     for (const auto& event : model.changeEdl().events()) {
         const std::string reason = obstacleOf(*event, Timecode::framerate(), bounds, rateLabel);
@@ -161,17 +190,16 @@ std::vector<PassedOver> passedOver(const DataModel& model, const std::string& ra
             passed.push_back({event.get(), reason});
     }
     if (passed.size() == model.changeEdl().size())
-        throw Failure{options.changeFiles.empty() ? joined(inputsOf(options.generation)) : joined(options.changeFiles),
-                      "no change event can be applied (the first: " + passed.front().reason + ")",
+        throw Failure{edlsOf(options), "no change event can be applied (the first: " + passed.front().reason + ")",
                       "check the timecodes and the frame rate of the project"};
     return passed;
 }
 
 /// What a run of the change list means for the times of the project, which begin at `origin`.
-ProgrammeShift shiftOf(const DataModel& model, double origin)
+ProgrammeShift shiftOf(const DataModel& model, const KeptRun* kept, double origin)
 {
     const Framerate framerate = Timecode::framerate();
-    const Bounds bounds(model.settings());
+    const Bounds bounds(model.settings(), kept);
     ProgrammeShift shift;
     shift.add(std::numeric_limits<double>::lowest(), bounds.start - origin, 0.0);
     shift.add(bounds.end - origin, std::numeric_limits<double>::max(), 0.0);
@@ -186,30 +214,21 @@ ProgrammeShift shiftOf(const DataModel& model, double origin)
     return shift;
 }
 
-/// What can be told before the run.
-ApplyFacts factsOf(HostedProject& hosted, const ChangeSource& source, const ApplyOptions& options)
+/// Throws the failure unless the user has said to go on.
+void require(const std::optional<Failure>& doubt, const ApplyOptions& options)
 {
-    const DataModel& model = hosted.model();
-    ApplyFacts facts(model);
-    facts.projectName = fileNameOf(options.projectFile);
-    facts.timeOrigin = hosted.project().timeOrigin();
-    if (source.cuts)
-        facts.generation.emplace(model, *source.cuts, Timecode::framerate());
-    facts.changeNames = source.fileNames;
-    facts.passedOver = passedOver(model, clockOf(hosted.project(), options.projectFile).rateLabel(), options);
-    facts.written = targetOf(options);
-    facts.jsonFile = JsonOutput::isFile(options.jsonFile) ? options.jsonFile : std::string();
-    return facts;
+    if (doubt && !options.isForced)
+        throw *doubt;
 }
 
 /// Takes the markers of earlier runs out that a run has replaced by its own, so that those count as new where they are the
-/// same.
-void forgetReplacedMarkers(ProjectState& state, const Settings& settings, double origin)
+/// same. `changed` is what the run may change, in seconds of the project's clock; null for all.
+void forgetReplacedMarkers(ProjectState& state, const core::SecondsRange* changed, double origin)
 {
     const auto isReplaced = [&](const Placement& marker) {
         const double start = marker.start + origin;
-        return !settings.restrictRange() || (start - settings.preserveMaterialBefore() > -standin::SameInstant &&
-                                             settings.preserveMaterialAfter() - start >= standin::SameInstant);
+        return !changed ||
+               (start - changed->start > -standin::SameInstant && changed->end - start >= standin::SameInstant);
     };
     for (auto& [track, placements] : state) {
         if (isMarkedByRuns(*track) && !track->isLocked())
@@ -217,15 +236,126 @@ void forgetReplacedMarkers(ProjectState& state, const Settings& settings, double
     }
 }
 
+/// What the run that was made could change, in seconds of the project's clock; nothing where it could change all.
+std::optional<core::SecondsRange> changedRange(const Settings& settings, const KeptRun* kept)
+{
+    if (kept)
+        return kept->bounds();
+    if (settings.restrictRange())
+        return core::SecondsRange{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()};
+    return std::nullopt;
+}
+
+/// What of the old programme the run carries over or leaves alone.
+FrameRanges sourcesOf(const DataModel& model, const KeptRun* kept)
+{
+    FrameRanges sources;
+    if (kept) {
+        for (const auto* events : {&kept->plan().events, &kept->plan().untouched}) {
+            for (const core::KeptEvent& event : *events)
+                sources.push_back(event.source());
+        }
+        return sources;
+    }
+    for (const auto& event : model.changeEdl().events()) {
+        if (const auto stretch = core::changeStretchOf(*event, Timecode::framerate()))
+            sources.push_back(stretch->source());
+    }
+    return sources;
+}
+
+/// What the run is going to be, and what is known of it before.
+class Preparation {
+public:
+    /// Throws Failure where the run can't be done, or where it doesn't look as if the user meant it.
+    Preparation(HostedProject& hosted, const ProjectClock& clock, const ApplyOptions& options, Terminal& terminal)
+        : m_hosted(hosted), m_clock(clock), m_options(options), m_edls(edlsOf(options)), m_facts(hosted.model())
+    {
+        DataModel& model = hosted.model();
+        EventList lastCut;
+        lastCut.append(model.newEdl().release());
+        const ChangeSource source = fillChangeList(model, options, terminal);
+        m_facts.projectName = fileNameOf(options.projectFile);
+        m_facts.timeOrigin = hosted.project().timeOrigin();
+        m_facts.changeNames = source.fileNames;
+        m_facts.written = targetOf(options);
+        m_facts.jsonFile = JsonOutput::isFile(options.jsonFile) ? options.jsonFile : std::string();
+        const Plausibility plausibility(model, options.projectFile, m_edls);
+        if (source.cuts)
+            checkCuts(plausibility, lastCut, terminal);
+        plan(source.cuts.has_value());
+        if (source.cuts) {
+            require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options);
+            m_facts.generation.emplace(model, isPlanned(source) ? m_kept->carried() : model.changeEdl(), *source.cuts,
+                                       Timecode::framerate());
+        }
+    }
+
+    const KeptRun* kept() const { return m_kept ? &*m_kept : nullptr; }
+    ApplyFacts& facts() { return m_facts; }
+
+private:
+    bool isPlanned(const ChangeSource& source) const { return m_kept && source.cuts; }
+
+    void checkCuts(const Plausibility& plausibility, const EventList& lastCut, Terminal& terminal)
+    {
+        require(plausibility.doubtOfLastCut(lastCut), m_options);
+        require(plausibility.doubtOfNames(), m_options);
+        require(plausibility.doubtOfSound(m_hosted.project()), m_options);
+        if (const auto dull = plausibility.dullNames()) {
+            terminal.warn(dull->warning);
+            m_facts.matchText = dull->summary;
+        }
+        if (m_options.keep == ApplyOptions::Keep::Cut)
+            requireChangeEvents(m_hosted.model(), m_options.generation);
+    }
+
+    void plan(bool isGenerated)
+    {
+        DataModel& model = m_hosted.model();
+        const bool isPlanned = m_options.keep == ApplyOptions::Keep::All;
+        if (!isPlanned || !isGenerated)
+            m_facts.passedOver = passedOver(model, m_clock.rateLabel(), m_options);
+        m_facts.appliedCount = model.changeEdl().size() - m_facts.passedOver.size();
+        if (!isPlanned)
+            return;
+        m_kept.emplace(model, m_hosted.project(), m_clock,
+                       isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_options.isForced, m_edls);
+        m_facts.isRunNeeded = m_kept->needsRun();
+        const Framerate framerate = Timecode::framerate();
+        for (const core::FrameRange& range : m_kept->plan().lost)
+            m_facts.lost.push_back({range.start / framerate.rate, range.end / framerate.rate});
+        if (!isGenerated)
+            return;
+        m_facts.appliedCount = model.changeEdl().size();
+        m_facts.kept = m_kept->plan().events;
+        for (const auto& event : m_kept->outside().events())
+            m_facts.passedOver.push_back({event.get(), "lies outside of the stretch that may change"});
+    }
+
+    HostedProject& m_hosted;
+    const ProjectClock& m_clock;
+    const ApplyOptions& m_options;
+    const std::string m_edls;
+    ApplyFacts m_facts;
+    std::optional<KeptRun> m_kept; ///< nothing where the change EDL alone counts
+};
+
 /// Runs, and adds what that did to the project.
-void apply(HostedProject& hosted, ApplyFacts& facts)
+void apply(HostedProject& hosted, const KeptRun* kept, ApplyFacts& facts)
 {
     ProjectState before = stateOf(hosted.project());
     const auto start = std::chrono::steady_clock::now();
-    hosted.apply();
+    if (kept)
+        kept->apply(hosted);
+    else
+        hosted.apply();
     facts.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
-    forgetReplacedMarkers(before, hosted.model().settings(), facts.timeOrigin);
-    facts.tracks = compare(before, hosted.project(), shiftOf(hosted.model(), facts.timeOrigin));
+    if (!kept || kept->needsRun()) {
+        const auto changed = changedRange(hosted.model().settings(), kept);
+        forgetReplacedMarkers(before, changed ? &*changed : nullptr, facts.timeOrigin);
+    }
+    facts.tracks = compare(before, hosted.project(), shiftOf(hosted.model(), kept, facts.timeOrigin));
 }
 
 /// Writes the files of the run, all or none. Throws Failure.
@@ -234,8 +364,9 @@ void write(HostedProject& hosted, const ApplyJson& report, const ApplyOptions& o
     std::optional<JsonOutput> json;
     if (!options.jsonFile.empty()) {
         json.emplace(options.jsonFile);
-        EventJson::write(hosted.model().changeEdl().events(), report.toJson(),
-                         [&](std::string_view text) { json->write(text); });
+        EventJson::write(
+            hosted.model().changeEdl().events(), report.toJson(), [&](std::string_view text) { json->write(text); },
+            [&](std::size_t index) { return report.partsOf(index); });
         json->finish();
     }
     Interruption::check();
@@ -264,19 +395,21 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     checkOutputs(options);
     Settings trial; // so that wrong usage is told at once
     configure(trial, options.generation.settings);
+    shiftsOf(options);
 
     terminal.showProgress("reading " + fileNameOf(options.projectFile));
     HostedProject hosted(options.projectFile, terminal);
     const ProjectClock clock = clockOf(hosted.project(), options.projectFile);
     requireRate(options, clock);
+    hosted.endPreview();
     configure(hosted.model().settings(), options.generation.settings);
     restrictRange(hosted.model().settings(), options.generation.settings.preserve);
-    const ChangeSource source = fillChangeList(hosted.model(), options, terminal);
-    ApplyFacts facts = factsOf(hosted, source, options);
+    Preparation run(hosted, clock, options, terminal);
+    ApplyFacts& facts = run.facts();
 
     std::optional<Interruption> interruption(std::in_place);
     terminal.clearProgress();
-    apply(hosted, facts);
+    apply(hosted, run.kept(), facts);
     terminal.showProgress("writing");
     write(hosted, ApplyJson(facts, clock), options);
     interruption.reset();

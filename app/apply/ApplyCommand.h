@@ -12,13 +12,20 @@ namespace cadrel::app {
 class Terminal;
 
 struct ApplyOptions {
+    enum class Keep {
+        All, ///< what the cuts don't speak of stays
+        Cut, ///< the change EDL and no more
+    };
+
     std::string projectFile;
     GenerationOptions generation;         ///< no files where there is a change EDL
     std::vector<std::string> changeFiles; ///< a change EDL, in order
     std::string outputFile;               ///< empty: none is written, but for `inPlace`
     std::string jsonFile;                 ///< empty: none is written; "-": standard output
-    bool inPlace = false;                 ///< the result replaces the project
-    bool summary = false;                 ///< the totals alone
+    Keep keep = Keep::All;
+    bool isForced = false; ///< goes on where the files don't seem to belong together
+    bool inPlace = false;  ///< the result replaces the project
+    bool summary = false;  ///< the totals alone
 };
 
 /// `cadrel apply`: carries a sound project over to a new cut. The files appear together when all has gone well, or not

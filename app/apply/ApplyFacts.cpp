@@ -2,26 +2,13 @@
 
 #include "app/apply/ApplyFacts.h"
 
-#include "core/model/DataModel.h"
-#include "host/track/TrackRole.h"
-#include "velmark/Attributes.h"
+#include "app/apply/RunMaterial.h"
 
 #include <algorithm>
-#include <variant>
 
 namespace cadrel::app {
 
-using host::TrackRole;
 using standin::Track;
-
-bool isMarkedByRuns(const Track& track)
-{
-    const auto attribute = track.attributes().find(Velmark::AttributeKey::MarkerType);
-    if (attribute == track.attributes().end())
-        return false;
-    const auto* role = std::get_if<Velmark::int64>(&attribute->second.value);
-    return role && *role >= TrackRole::Destination && *role <= TrackRole::Overlap;
-}
 
 std::vector<const TrackComparison*> ApplyFacts::userTracks() const
 {
@@ -41,11 +28,6 @@ std::vector<const TrackComparison*> ApplyFacts::markedTracks() const
             found.push_back(&track);
     }
     return found;
-}
-
-std::size_t ApplyFacts::appliedCount() const
-{
-    return model.changeEdl().size() - passedOver.size();
 }
 
 FateCount& FateCount::operator+=(const TrackComparison& track)

@@ -4,6 +4,8 @@
 
 #include "app/apply/ProjectComparison.h"
 #include "app/edl/GenerationReport.h"
+#include "core/keep/KeepPlan.h"
+#include "core/time/SecondsRange.h"
 
 #include <cstddef>
 #include <optional>
@@ -16,9 +18,6 @@ class EventBase;
 } // namespace cadrel::core
 
 namespace cadrel::app {
-
-/// Whether runs write markers on the track: true for all of Cadrel's marker tracks except the one for the user's memos.
-bool isMarkedByRuns(const standin::Track& track);
 
 /// A change event that a run leaves out, and why.
 struct PassedOver {
@@ -34,7 +33,6 @@ struct ApplyFacts {
     /// The user's tracks that have or had something on them, and the tracks for the markers of a run.
     std::vector<const TrackComparison*> userTracks() const;
     std::vector<const TrackComparison*> markedTracks() const;
-    std::size_t appliedCount() const;
 
     const core::DataModel& model;
     std::string projectName;
@@ -42,6 +40,12 @@ struct ApplyFacts {
     std::optional<GenerationReport> generation; ///< nothing where the change EDL was given
     std::vector<std::string> changeNames;       ///< its files then
     std::vector<PassedOver> passedOver;
+    std::size_t appliedCount = 0;
+    bool isRunNeeded = true; ///< false: the project is as the new cut needs it
+    /// For each event of the change list where its stretches are from; empty where all are from the cut.
+    std::vector<core::KeptEvent> kept;
+    std::vector<core::SecondsRange> lost; ///< what goes although no picture stands there; by the project's clock
+    std::string matchText;                ///< what the match rests on; empty where the names tell the shots apart
     std::vector<TrackComparison> tracks;
     double seconds = 0.0; ///< that the run took
     std::string written;  ///< the project file; empty for none

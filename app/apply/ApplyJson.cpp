@@ -2,8 +2,10 @@
 
 #include "app/apply/ApplyJson.h"
 
+#include "app/apply/KeptRun.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
+#include "core/time/Timecode.h"
 #include "standin/base/Utf16.h"
 
 #include <utility>
@@ -55,13 +57,38 @@ ordered_json ApplyJson::toJson() const
         json.update(m_facts.generation->toJson());
     else
         json["change"] = {{"files", m_facts.changeNames}, {"invalid", changes.countInvalid()}};
-    json["applied"] = m_facts.appliedCount();
+    json["runNeeded"] = m_facts.isRunNeeded;
+    json["applied"] = m_facts.appliedCount;
     json["passedOver"] = std::move(passedOver);
+    ordered_json lost = ordered_json::array();
+    for (const core::SecondsRange& range : m_facts.lost)
+        lost.push_back(span(range.start - m_facts.timeOrigin, range.end - m_facts.timeOrigin));
+    json["lost"] = std::move(lost);
     json["seconds"] = m_facts.seconds;
     json["tracks"] = std::move(tracks);
     json["markers"] = std::move(markers);
     json["written"] = m_facts.written.empty() ? ordered_json() : ordered_json(m_facts.written);
     return json;
+}
+
+ordered_json ApplyJson::partsOf(std::size_t event) const
+{
+    ordered_json parts = ordered_json::array();
+    const auto add = [&parts](const std::string& srcIn, const std::string& srcOut, const std::string& dstIn,
+                              const std::string& dstOut, const char* from) {
+        parts.push_back({{"srcIn", srcIn}, {"srcOut", srcOut}, {"dstIn", dstIn}, {"dstOut", dstOut}, {"from", from}});
+    };
+    if (event < m_facts.kept.size()) {
+        const auto timecode = [](std::int32_t frame) { return core::Timecode(frame).toString(); };
+        for (const core::CarriedStretch& part : m_facts.kept[event].parts)
+            add(timecode(part.source().start), timecode(part.source().end), timecode(part.destination.start),
+                timecode(part.destination.end), wordOf(part.from));
+    } else {
+        const core::EventBase& whole = m_facts.model.changeEdl().at(event);
+        add(whole.srcIn().toString(), whole.srcOut().toString(), whole.dstIn().toString(), whole.dstOut().toString(),
+            wordOf(core::CarriedFrom::Cut));
+    }
+    return {{"parts", std::move(parts)}};
 }
 
 ordered_json ApplyJson::toJson(const Fate& fate) const

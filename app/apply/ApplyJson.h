@@ -5,6 +5,7 @@
 #include "app/apply/ApplyFacts.h"
 #include "app/project/ProjectClock.h"
 
+#include <cstddef>
 #include <nlohmann/json.hpp>
 
 namespace cadrel::app {
@@ -18,6 +19,8 @@ public:
     ApplyJson(const ApplyFacts& facts, const ProjectClock& clock) : m_facts(facts), m_clock(clock) {}
 
     nlohmann::ordered_json toJson() const;
+    /// {"parts": [...]} of a change event: what it consists of, and where each part is "from".
+    nlohmann::ordered_json partsOf(std::size_t event) const;
 
 private:
     nlohmann::ordered_json toJson(const TrackComparison& track) const;

@@ -156,8 +156,15 @@ void ApplyListing::printTotals(std::ostream& out) const
     const std::vector<std::string> settings = unusualSettings(model.settings(), timeText);
     if (!settings.empty())
         out << "Settings    " << joined(settings) << '\n';
-    out << "Applied     " << counted(m_facts.appliedCount(), "event") << " in " << secondsText(m_facts.seconds) << '\n';
+    if (!m_facts.matchText.empty())
+        out << "Match       " << m_facts.matchText << '\n';
+    if (m_facts.isRunNeeded)
+        out << "Applied     " << counted(m_facts.appliedCount, "event") << " in " << secondsText(m_facts.seconds)
+            << '\n';
+    else
+        out << "Applied     nothing, since no track has to change\n";
     printPassedOver(out);
+    printLost(out);
 
     printClips(out);
     printWritten(out);
@@ -170,6 +177,16 @@ void ApplyListing::printPassedOver(std::ostream& out) const
     out << "Passed over " << counted(m_facts.passedOver.size(), "event") << '\n';
     for (const PassedOver& passed : m_facts.passedOver)
         out << "            " << eventText(*passed.event) << ": " << passed.reason << '\n';
+}
+
+void ApplyListing::printLost(std::ostream& out) const
+{
+    const auto timeText = [this](double seconds) { return m_clock.timecode(seconds - m_facts.timeOrigin); };
+    const char* title = "Lost        ";
+    for (const core::SecondsRange& range : m_facts.lost) {
+        out << title << timeText(range.start) << " - " << timeText(range.end) << ", for want of room\n";
+        title = "            ";
+    }
 }
 
 void ApplyListing::printClips(std::ostream& out) const

@@ -89,11 +89,14 @@ core::DataModel& HostedProject::model()
     return *m_host->getProjectModel();
 }
 
-void HostedProject::apply()
+void HostedProject::endPreview()
 {
-    // A project can have been saved in the middle of a preview.
     if (m_host->isPreviewActive())
         m_host->setPreviewActive(false);
+}
+
+void HostedProject::apply()
+{
     const Result::Type result = m_host->startCadrel();
     if (result != Result::Ok)
         throw startFailure(result, m_file);

@@ -32,6 +32,8 @@ public:
     standin::Project& project() { return *m_project; }
     core::DataModel& model();
 
+    /// A project can have been saved in the middle of a preview, which a run and its plan must not meet.
+    void endPreview();
     /// Applies the change list of the model. An Interruption cancels it, and what has been done is taken back. Throws
     /// Interruption::Requested then, and Failure when the run couldn't begin or failed.
     void apply();

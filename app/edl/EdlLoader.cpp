@@ -82,6 +82,7 @@ std::list<LoadedEdl> EdlLoader::load(const std::vector<std::string>& files) cons
             edl.path = file;
             load(edl);
             checkRate(edl);
+            m_options.shifts.apply(edl.path, edl.events, m_options.shiftedTimes);
         }
     }
     return edls;

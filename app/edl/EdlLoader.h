@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "app/edl/FileShifts.h"
 #include "core/edl/EventList.h"
 #include "core/fileio/SourceLine.h"
 #include "core/time/Framerate.h"
@@ -20,6 +21,9 @@ struct LoadOptions {
     bool renameBRolls = true; ///< "A001B" is "A001" if the file has that too
     bool acceptAudio = false; ///< events of audio channels are no flaw
     bool strict = false;      ///< a warning is a failure
+    FileShifts shifts;        ///< what is moved while it is read
+    FileShifts::Times shiftedTimes = FileShifts::Times::Destination;
+    bool refusesSameTimecodes = false; ///< two files of one cut on the same timecode are a failure, not a warning
     /// What the user can do about a file that doesn't fit the rate.
     std::string rateAdvice = "check the file or give another --rate";
 };

@@ -44,12 +44,15 @@ std::string textOf(const ordered_json& value)
 
 } // namespace
 
-void EventJson::write(Events events, const ordered_json& furtherKeys, const Sink& sink)
+void EventJson::write(Events events, const ordered_json& furtherKeys, const Sink& sink, const KeysOf& keysOf)
 {
     sink("{\n\"events\": [");
     const char* separator = "\n";
-    for (const auto& event : events) {
-        sink(separator + textOf(toJson(*event)));
+    for (std::size_t index = 0; index < events.size(); ++index) {
+        ordered_json event = toJson(*events[index]);
+        if (keysOf)
+            event.update(keysOf(index));
+        sink(separator + textOf(event));
         separator = ",\n";
     }
     sink("\n]");

@@ -4,6 +4,7 @@
 
 #include "core/edl/EventBase.h"
 
+#include <cstddef>
 #include <functional>
 #include <memory>
 #include <nlohmann/json.hpp>
@@ -21,8 +22,12 @@ public:
     using Events = std::span<const std::shared_ptr<core::EventBase>>;
     using Sink = std::function<void(std::string_view)>;
 
-    /// Gives the document to `sink` piece by piece, so that a million events need the memory of one.
-    static void write(Events events, const nlohmann::ordered_json& furtherKeys, const Sink& sink);
+    /// The further keys of an event, by its place in the list.
+    using KeysOf = std::function<nlohmann::ordered_json(std::size_t)>;
+
+    /// Gives the document to `sink` piece by piece, so that a million events need the memory of one. `keysOf` may be empty.
+    static void write(Events events, const nlohmann::ordered_json& furtherKeys, const Sink& sink,
+                      const KeysOf& keysOf = {});
 };
 
 } // namespace cadrel::app

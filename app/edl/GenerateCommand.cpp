@@ -90,7 +90,8 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
         EdlLoader(options.generation.load, terminal).chooseRate(options.generation.oldFiles.front()));
     const std::string rate = ProjectFramerate::labelOf(framerate.getFramerate());
     const Cuts cuts = generateChangeEdl(model, options.generation, terminal);
-    const GenerationReport report(model, cuts, framerate.getFramerate());
+    requireChangeEvents(model, options.generation);
+    const GenerationReport report(model, model.changeEdl(), cuts, framerate.getFramerate());
     const std::vector<std::string> changeFiles = filesOf(options.changeFile, model.changeEdl().size());
     checkOutputs(options, changeFiles);
 

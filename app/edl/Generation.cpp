@@ -12,6 +12,8 @@
 #include "util/Result.h"
 
 #include <cstddef>
+#include <list>
+#include <utility>
 
 namespace cadrel::app {
 
@@ -77,7 +79,7 @@ Failure failureOf(const GenerationFailure& failed, Result::Type result, const Ge
     return {joined(inputsOf(options)), "no change EDL can be made" + reason, "check the timecodes"};
 }
 
-/// Fills the change list. Throws Failure, also when nothing survives.
+/// Fills the change list. Throws Failure.
 void generate(DataModel& model, const GenerationOptions& options, Terminal& terminal)
 {
     terminal.showProgress("generating the change EDL");
@@ -85,10 +87,6 @@ void generate(DataModel& model, const GenerationOptions& options, Terminal& term
     const Result::Type result = model.generateChangeEdl([&](const GenerationFailure& failure) { failed = failure; });
     if (result != Result::Ok)
         throw failureOf(failed, result, options);
-    if (model.changeEdl().isEmpty())
-        throw Failure{joined(inputsOf(options)),
-                      "nothing of the old cut survives in the new one, so there is no change EDL",
-                      "see that both are of one reel, and try --match or --vfx"};
 }
 
 } // namespace
@@ -113,10 +111,12 @@ void configure(Settings& settings, const GivenSettings& given)
             row < given.vfxPatterns.size() ? vfxPatternOf(given.vfxPatterns[row]) : VfxPatternEntry(), row);
 }
 
-std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)
+namespace {
+
+std::vector<std::string> takeEvents(std::list<LoadedEdl> edls, EventList& events)
 {
     std::vector<std::string> names;
-    for (LoadedEdl& edl : loader.load(files)) {
+    for (LoadedEdl& edl : edls) {
         EdlLoader::refuseUnreadable(edl);
         events.append(edl.events.release());
         names.push_back(fileNameOf(edl.path));
@@ -124,13 +124,42 @@ std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<s
     return names;
 }
 
+std::vector<std::string> loadCut(const std::vector<std::string>& files, EventList& events, const LoadOptions& options,
+                                 Terminal& terminal)
+{
+    std::list<LoadedEdl> edls = EdlLoader(options, terminal).load(files);
+    requireParted(edls, options.refusesSameTimecodes || options.strict, terminal);
+    return takeEvents(std::move(edls), events);
+}
+
+} // namespace
+
+std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)
+{
+    return takeEvents(loader.load(files), events);
+}
+
+Cuts loadCuts(DataModel& model, const GenerationOptions& options, Terminal& terminal)
+{
+    LoadOptions load = options.load;
+    load.shifts = FileShifts(options.shifts, inputsOf(options));
+    return {loadCut(options.oldFiles, model.oldEdl(), load, terminal),
+            loadCut(options.newFiles, model.newEdl(), load, terminal)};
+}
+
 Cuts generateChangeEdl(DataModel& model, const GenerationOptions& options, Terminal& terminal)
 {
-    const EdlLoader loader(options.load, terminal);
-    const Cuts cuts{loadEvents(loader, options.oldFiles, model.oldEdl()),
-                    loadEvents(loader, options.newFiles, model.newEdl())};
+    const Cuts cuts = loadCuts(model, options, terminal);
     generate(model, options, terminal);
     return cuts;
+}
+
+void requireChangeEvents(const DataModel& model, const GenerationOptions& options)
+{
+    if (model.changeEdl().isEmpty())
+        throw Failure{joined(inputsOf(options)),
+                      "nothing of the old cut survives in the new one, so there is no change EDL",
+                      "see that both are of one reel, and try --match or --vfx"};
 }
 
 } // namespace cadrel::app

@@ -23,6 +23,7 @@ struct GenerationOptions {
     std::vector<std::string> newFiles;
     LoadOptions load;
     GivenSettings settings;
+    std::vector<std::string> shifts; ///< for FileShifts
 };
 
 /// The names of the files that were read.
@@ -42,7 +43,11 @@ void configure(core::Settings& settings, const GivenSettings& given);
 std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files,
                                     core::EventList& events);
 
-/// Reads both cuts into the model and makes the change EDL by its settings. Throws Failure, also when nothing survives.
+/// Reads both cuts into the model. Throws Failure, and UsageError for a shift that can't be one.
+Cuts loadCuts(core::DataModel& model, const GenerationOptions& options, Terminal& terminal);
+/// Reads both cuts into the model and makes the change EDL by its settings, which may be empty. Throws as `loadCuts`.
 Cuts generateChangeEdl(core::DataModel& model, const GenerationOptions& options, Terminal& terminal);
+/// Throws Failure when nothing survives.
+void requireChangeEvents(const core::DataModel& model, const GenerationOptions& options);
 
 } // namespace cadrel::app

@@ -42,9 +42,9 @@ std::string describeEvents(const EventList& events, const std::vector<std::strin
            (invalid == 0 ? "all valid" : std::to_string(invalid) + " invalid");
 }
 
-GenerationReport::GenerationReport(const DataModel& model, Cuts cuts, const Framerate& framerate)
-    : m_model(model), m_cuts(std::move(cuts)), m_framerate(framerate),
-      m_coverage(model.newEdl(), model.changeEdl(), framerate)
+GenerationReport::GenerationReport(const DataModel& model, const EventList& carried, Cuts cuts,
+                                   const Framerate& framerate)
+    : m_model(model), m_cuts(std::move(cuts)), m_framerate(framerate), m_coverage(model.newEdl(), carried, framerate)
 {
     for (const auto& event : model.changeEdl().events()) {
         if (const auto* healed = dynamic_cast<const HealedEvent*>(event.get())) {

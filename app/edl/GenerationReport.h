@@ -12,6 +12,7 @@
 
 namespace cadrel::core {
 class DataModel;
+class EventList;
 } // namespace cadrel::core
 
 namespace cadrel::app {
@@ -19,8 +20,10 @@ namespace cadrel::app {
 /// The report about a change EDL that was made of two cuts, for people and for programs.
 class GenerationReport {
 public:
-    /// The model holds both cuts and the change EDL, and outlives the report.
-    GenerationReport(const core::DataModel& model, Cuts cuts, const core::Framerate& framerate);
+    /// The model holds both cuts and the change EDL, and outlives the report. `carried` is all that has old sound in the
+    /// new cut: the change EDL, or more.
+    GenerationReport(const core::DataModel& model, const core::EventList& carried, Cuts cuts,
+                     const core::Framerate& framerate);
 
     /// "Old cut", "New cut" and "Frame rate" with what is told about it, a line each.
     std::string cutsText(const std::string& rate) const;

@@ -106,7 +106,9 @@ void runList(const ListOptions& options, Terminal& terminal)
     const bool jsonOnly = JsonOutput::isStandardOutput(options.jsonFile);
     if (!options.jsonFile.empty() && !jsonOnly)
         refuseToOverwrite(options.files, options.jsonFile);
-    const EdlLoader loader(options.load, terminal);
+    LoadOptions load = options.load;
+    load.shifts = FileShifts(options.shifts, options.files);
+    const EdlLoader loader(load, terminal);
     const ProjectFramerate rate(loader.chooseRate(options.files.front()));
     const std::string label = ProjectFramerate::labelOf(rate.getFramerate());
     // Deleting a long list event by event takes a quarter of the whole time; the end of the program frees it at once.

@@ -16,6 +16,7 @@ struct ListOptions {
     std::string jsonFile; ///< empty: none is written; "-": standard output
     bool summary = false; ///< the totals alone
     LoadOptions load;
+    std::vector<std::string> shifts; ///< for FileShifts
 };
 
 /// `cadrel list`: shows the events of EDLs and what is wrong with them. Throws Failure and UsageError.

@@ -71,8 +71,7 @@ void runNotes(const NotesOptions& options, Terminal& terminal)
     configure(model.settings(), options.generation.settings);
     const EdlLoader loader(options.generation.load, terminal);
     const ProjectFramerate framerate(loader.chooseRate(options.generation.oldFiles.front()));
-    const Cuts cuts{loadEvents(loader, options.generation.oldFiles, model.oldEdl()),
-                    loadEvents(loader, options.generation.newFiles, model.newEdl())};
+    const Cuts cuts = loadCuts(model, options.generation, terminal);
     terminal.showProgress("comparing the cuts");
     const ChangeNotes notes(model.oldEdl(), model.newEdl(), rulesFrom(model.settings(), framerate.getFramerate()),
                             options.simplify);

@@ -301,12 +301,12 @@ TEST(Apply, ThePageForPeople)
 Old cut     old.edl: 3 events, all valid
 New cut     new.edl: 4 events, all valid
 Frame rate  24 fps, as the project has it
-Change EDL  3 events
+Change EDL  2 events
 Covered     00:00:28:00 of 00:00:32:00, 87.5 %
-Applied     3 events
+Applied     2 events
 Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 in no cut
 Own markers 3: 1 stay, 1 moved, 1 in no cut
-New markers 3 Destination, 1 Insert
+New markers 2 Destination, 1 Insert
 Written     no project; give -o PROJECT.stage or --in-place
 
 track                              holds  stay  moved  trimmed  split  doubled  in no cut  new
@@ -336,11 +336,10 @@ Memos (marker, in Cadrel Markers)
   01:00:11:00                                                       cut it?          in no cut
   01:00:13:00               01:00:11:00               -00:00:02:00  again            moved
 
-Destination, 3 markers
+Destination, 2 markers
   in           out          length       marker
-  01:00:00:00  01:00:10:00  00:00:10:00  Event: 1 - A001
-  01:00:10:00  01:00:18:00  00:00:08:00  Event: 2 - A002
-  01:00:22:00  01:00:32:00  00:00:10:00  Event: 3 - A003
+  01:00:10:00  01:00:18:00  00:00:08:00  Event: 1 - A002
+  01:00:22:00  01:00:32:00  00:00:10:00  Event: 2 - A003
 
 Insert, 1 marker
   in           out          length       marker
@@ -367,8 +366,8 @@ TEST(Apply, TheReportHasTheEventsAndWhatTheCutsHold)
     EXPECT_EQ(report.at("project"), "scene.stage");
     EXPECT_EQ(report.at("rate"), "24 fps");
     EXPECT_EQ(report.at("old"), (json{{"files", {"old.edl"}}, {"events", 3}, {"invalid", 0}}));
-    EXPECT_EQ(report.at("events").size(), 3U);
-    EXPECT_EQ(report.at("applied"), 3);
+    EXPECT_EQ(report.at("events").size(), 2U);
+    EXPECT_EQ(report.at("applied"), 2);
     EXPECT_EQ(report.at("passedOver"), json::array());
     EXPECT_EQ(report.at("inserts").at(0).at("dstIn"), "01:00:18:00");
     EXPECT_EQ(report.at("written"), json());
@@ -422,10 +421,10 @@ TEST(Apply, ChangeEdlsThatWereMadeBeforeDoTheSame)
             .status,
         0);
     const auto result = scene.folder / "result.stage";
-    ASSERT_EQ(scene.apply({"-o", result}).status, 0);
+    ASSERT_EQ(scene.apply({"--keep", "cut", "-o", result}).status, 0);
     const auto other = scene.folder / "other.stage";
 
-    const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "-o", other});
+    const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "--keep", "cut", "-o", other});
 
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_TRUE(tells(outcome.out, "Change EDL  change.edl: 3 events, all valid\n")) << outcome.out;
@@ -464,7 +463,7 @@ TEST(Apply, WhereStretchesOverlapTheLastOneHolds)
             "change.edl", "TITLE: CHANGE\n" + cut("001", "A001", "01:00:00:00 01:00:12:00", "01:00:00:00 01:00:12:00") +
                               cut("002", "A001", "01:00:00:00 01:00:05:00", "01:00:09:00 01:00:14:00"));
 
-        const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "--json", "-"});
+        const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, "--keep", "cut", "--json", "-"});
 
         EXPECT_EQ(changesOf(json::parse(outcome.out), "DIA"),
                   (Words{"hello: 1-4 -> 1-4, 10-13", "long line: 8-14 -> 8-9", "lost line: 10.5-11.5 -> nothing",
@@ -534,7 +533,8 @@ TEST(Apply, EachKindOfMarkerCanBeSwitchedOff)
         "change.edl", "TITLE: CHANGE\n" + cut("001", "A001", "01:00:00:00 01:00:10:00", "01:00:00:00 01:00:10:00") +
                           cut("002", "A002", "01:00:08:00 01:00:14:00", "01:00:09:00 01:00:15:00"));
     const auto overlapsWith = [&](const std::string& option) {
-        const Outcome outcome = runCadrel({"apply", scene.project, "--change", change, option, "--json", "-"});
+        const Outcome outcome =
+            runCadrel({"apply", scene.project, "--change", change, "--keep", "cut", option, "--json", "-"});
         return kindsIn(json::parse(outcome.out))["Overlap"];
     };
     EXPECT_EQ(overlapsWith("--overlap-markers"), 1U);
@@ -695,7 +695,7 @@ TEST(Apply, OutsideOfAPreservedStretchNothingChanges)
         EXPECT_EQ(outcome.status, 0) << outcome.err;
         EXPECT_TRUE(tells(outcome.out, "Settings    between 01:00:10:00 and 01:00:20:00 alone\n")) << outcome.out;
         EXPECT_TRUE(
-            tells(outcome.out, "003  01:00:22:00  01:00:32:00  A003: lies outside of the stretch that may change\n"))
+            tells(outcome.out, "002  01:00:22:00  01:00:32:00  A003: lies outside of the stretch that may change\n"))
             << outcome.out;
         EXPECT_EQ(placesOn("DIA", result), (Places{{"hello", {"1-4"}},
                                                    {"long line", {"8-10", "10-12 from 4"}},
@@ -731,7 +731,7 @@ TEST(Apply, WhatIsNotGivenIsAsInTheLastRun)
                   .status,
               0);
     const auto settingsWith = [&](const Words& more) {
-        Words words{"apply", result, "--old", scene.oldFile, "--new", scene.newFile, "--summary"};
+        Words words{"apply", result, "--old", scene.oldFile, "--new", scene.newFile, "--summary", "--force"};
         words.insert(words.end(), more.begin(), more.end());
         const Outcome outcome = runCadrel(words);
         EXPECT_EQ(outcome.status, 0) << outcome.err;
@@ -792,10 +792,9 @@ TEST(Apply, ASecondRunTellsItsOwnMarkersAlone)
     const Scene scene;
     ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
 
-    const json report = scene.applyAsJson();
+    const json report = scene.applyAsJson({"--force"});
 
-    EXPECT_EQ(markersOf(report, "Destination"),
-              (Words{"0-10 Event: 1 - A001 ", "10-18 Event: 2 - A002 ", "22-32 Event: 3 - A003 "}));
+    EXPECT_EQ(markersOf(report, "Destination"), (Words{"10-18 Event: 1 - A002 ", "22-32 Event: 2 - A003 "}));
     EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
 
     const json ofStretch = scene.applyAsJson({"--preserve", "01:00:10:00", "01:00:20:00"});
@@ -879,7 +878,7 @@ TEST(Apply, ABrokenModelIsToldOfAndReplaced)
     EXPECT_EQ(outcome.status, 0);
     EXPECT_TRUE(tells(outcome.err, "An error occurred while loading the Cadrel data. The data will be ignored."))
         << outcome.err;
-    EXPECT_EQ(scene.apply().err, "");
+    EXPECT_EQ(scene.apply({"--force"}).err, "");
 }
 
 TEST(Apply, TheProjectHasToRunAtTheRateThatIsGiven)
@@ -1040,7 +1039,7 @@ TEST(Apply, OnATerminalTheProgressOfTheRunIsShown)
 
     EXPECT_EQ(outcome.status, 0);
     EXPECT_TRUE(tells(outcome.out, "Processing Project")) << outcome.out;
-    EXPECT_TRUE(tells(outcome.out, "Applied     3 events")) << outcome.out;
+    EXPECT_TRUE(tells(outcome.out, "Applied     2 events")) << outcome.out;
     EXPECT_EQ(scene.apply({"--summary"}).err, "");
 }
 

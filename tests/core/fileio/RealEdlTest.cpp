@@ -171,7 +171,8 @@ TEST(RealEdl, EachFileShowsItsRateWithoutAProject)
 
 TEST(RealEdl, EveryFileWithPictureIsAnEdlOfTheTree)
 {
-    std::vector<std::string> paths{"examples/reel3/reel3_v07.edl", "examples/reel3/reel3_v12.edl"};
+    std::vector<std::string> paths{"examples/reel3/reel3_v07.edl", "examples/reel3/reel3_v12.edl",
+                                   "examples/tworeels/new.edl", "examples/tworeels/old.edl"};
     for (const Content& content : Contents) {
         if (content.file.ends_with(".edl"))
             paths.push_back("tests/data/edl/" + std::string(content.file));

@@ -1,0 +1,238 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "app/apply/KeptRun.h"
+
+#include "app/apply/HostedProject.h"
+#include "app/apply/RunMaterial.h"
+#include "app/console/Failure.h"
+#include "app/console/Wording.h"
+#include "app/project/ProjectClock.h"
+#include "core/edl/EventBase.h"
+#include "core/keep/KeepPlanner.h"
+#include "core/keep/KeptChangeList.h"
+#include "core/model/DataModel.h"
+#include "core/settings/Settings.h"
+#include "core/time/Timecode.h"
+#include "standin/project/Project.h"
+
+#include <algorithm>
+#include <array>
+#include <iterator>
+#include <memory>
+#include <utility>
+
+namespace cadrel::app {
+
+using core::DataModel;
+using core::EventBase;
+using core::EventList;
+using core::FrameRange;
+using core::FrameRanges;
+using core::Framerate;
+using core::KeepContext;
+using core::KeepPlan;
+using core::KeepPlanner;
+using core::KeepRefusal;
+using core::KeptEvent;
+using core::SecondsRange;
+using core::Settings;
+using core::Timecode;
+
+namespace {
+
+/// While it lives, a run may change what lies between the bounds alone.
+class RestrictedRange {
+public:
+    RestrictedRange(Settings& settings, const SecondsRange& bounds)
+        : m_settings(settings), m_wasRestricted(settings.restrictRange()), m_former{settings.preserveMaterialBefore(),
+                                                                                    settings.preserveMaterialAfter()}
+    {
+        set(true, bounds);
+    }
+    RestrictedRange(const RestrictedRange&) = delete;
+    RestrictedRange& operator=(const RestrictedRange&) = delete;
+    ~RestrictedRange() { set(m_wasRestricted, m_former); }
+
+private:
+    void set(bool isRestricted, const SecondsRange& range)
+    {
+        m_settings.set(&Settings::restrictRange, isRestricted);
+        m_settings.set(&Settings::preserveMaterialBefore, range.start);
+        m_settings.set(&Settings::preserveMaterialAfter, range.end);
+    }
+
+    Settings& m_settings;
+    bool m_wasRestricted;
+    SecondsRange m_former;
+};
+
+/// While it lives, a change list that holds nothing has one event that a run passes over. A run takes the old sound away
+/// then, but doesn't begin without an event.
+class NothingCarried {
+public:
+    explicit NothingCarried(EventList& list) : m_list(list), m_isNeeded(list.isEmpty())
+    {
+        if (!m_isNeeded)
+            return;
+        auto event = std::make_shared<EventBase>();
+        const Timecode none(0, MinuteOfNoHour, 0, 0);
+        event->setTimecodes(none, none, none, none);
+        m_list.add(std::move(event));
+    }
+    NothingCarried(const NothingCarried&) = delete;
+    NothingCarried& operator=(const NothingCarried&) = delete;
+    ~NothingCarried()
+    {
+        if (m_isNeeded)
+            m_list.clear();
+    }
+
+private:
+    static constexpr std::int32_t MinuteOfNoHour = 99;
+
+    EventList& m_list;
+    bool m_isNeeded;
+};
+
+KeepContext contextOf(const DataModel& model, const standin::Project& project, bool isForced)
+{
+    const Settings& settings = model.settings();
+    KeepContext context;
+    context.framerate = Timecode::framerate();
+    context.matchBy = settings.matchBy();
+    context.vfxPatterns = settings.vfxPatterns();
+    context.material = RunMaterial(project, settings).stretches();
+    if (settings.restrictRange())
+        context.preserve = SecondsRange{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()};
+    context.isForced = isForced;
+    return context;
+}
+
+/// The texts of ranges of frames, in a message.
+class RangeTexts {
+public:
+    RangeTexts(const ProjectClock& clock, double timeOrigin, const Framerate& framerate)
+        : m_clock(clock), m_timeOrigin(timeOrigin), m_framerate(framerate)
+    {
+    }
+
+    std::string length(std::int32_t frames) const { return m_clock.length(frames / m_framerate.rate); }
+    std::string place(std::int32_t frame) const { return m_clock.timecode(frame / m_framerate.rate - m_timeOrigin); }
+    /// "2 reels (01:00:00:00 - 01:18:00:00, 02:00:00:00 - 02:20:00:00)".
+    std::string reels(const FrameRanges& reels) const
+    {
+        constexpr std::size_t Most = 6;
+        std::vector<std::string> texts;
+        for (std::size_t index = 0; index < std::min(reels.size(), Most); ++index)
+            texts.push_back(place(reels[index].start) + " - " + place(reels[index].end));
+        if (reels.size() > Most)
+            texts.emplace_back("...");
+        return counted(reels.size(), "reel") + (texts.empty() ? "" : " (" + joined(texts) + ")");
+    }
+
+private:
+    const ProjectClock& m_clock;
+    double m_timeOrigin;
+    Framerate m_framerate;
+};
+
+Failure failureOf(const KeepRefusal& refusal, const RangeTexts& texts, const std::string& inputs)
+{
+    const std::string amount = texts.length(refusal.amount());
+    const std::string first = refusal.material.empty() ? std::string() : texts.place(refusal.material.front().start);
+    switch (refusal.reason) {
+    case KeepRefusal::UnequalReels:
+        return {inputs,
+                "the old cut has " + texts.reels(refusal.oldReels) + ", and the new cut has " +
+                    texts.reels(refusal.newReels),
+                "give both cuts of the same reels; or does what stands around the reels stay in its place? then give "
+                "--force"};
+    case KeepRefusal::OutsideOfDay:
+        return {inputs,
+                amount + " of sound or markers, from " + first +
+                    " on, would have to move, but no timecode of a day names their place",
+                "move them into the day, or lock their tracks"};
+    case KeepRefusal::MaterialInTheWay:
+        break;
+    }
+    return {inputs,
+            amount + " of sound or markers, from " + first + " on, stand where the change EDL puts its stretches",
+            "make room for them, or give --force to let the cut win"};
+}
+
+/// The list of some events of a plan.
+EventList listOf(std::vector<KeptEvent> events, const DataModel& model)
+{
+    KeepPlan plan;
+    plan.events = std::move(events);
+    return core::keptChangeList(plan, model.newEdl(), model.settings().matchBy(), Timecode::framerate());
+}
+
+void sortByDestination(std::vector<KeptEvent>& events)
+{
+    std::sort(events.begin(), events.end(),
+              [](const KeptEvent& a, const KeptEvent& b) { return a.destination.start < b.destination.start; });
+}
+
+std::vector<KeptEvent> movedOf(const std::vector<KeptEvent>& events)
+{
+    std::vector<KeptEvent> moved;
+    std::copy_if(events.begin(), events.end(), std::back_inserter(moved),
+                 [](const KeptEvent& event) { return event.shift != 0; });
+    return moved;
+}
+
+SecondsRange intersect(const SecondsRange& a, const SecondsRange& b)
+{
+    return {std::max(a.start, b.start), std::min(a.end, b.end)};
+}
+
+} // namespace
+
+KeptRun::KeptRun(DataModel& model, const standin::Project& project, const ProjectClock& clock, Source source,
+                 bool isForced, const std::string& inputs)
+{
+    const KeepContext context = contextOf(model, project, isForced);
+    const KeepPlanner planner(context);
+    m_plan = source == Source::Given ? planner.planGiven(model.changeEdl())
+                                     : planner.plan(model.oldEdl(), model.newEdl(), model.changeEdl());
+    if (m_plan.refusal)
+        throw failureOf(*m_plan.refusal, RangeTexts(clock, project.timeOrigin(), context.framerate), inputs);
+    if (m_plan.needsRun()) {
+        m_bounds = core::hullSeconds(m_plan, context.framerate);
+        if (context.preserve)
+            m_bounds = intersect(*m_bounds, *context.preserve);
+    }
+    if (source == Source::Given)
+        return;
+    std::vector<KeptEvent> all = m_plan.untouched;
+    all.insert(all.end(), m_plan.events.begin(), m_plan.events.end());
+    sortByDestination(all);
+    m_carried.append(listOf(std::move(all), model).release());
+    m_outside.append(listOf(movedOf(m_plan.untouched), model).release());
+    EventList kept = listOf(m_plan.events, model);
+    model.changeEdl().clear();
+    model.changeEdl().append(kept.release());
+    // Their numbers go on after those of the list.
+    auto number = static_cast<std::uint32_t>(model.changeEdl().size());
+    for (const auto& event : m_outside.events())
+        event->setEventNumber(++number);
+}
+
+void KeptRun::apply(HostedProject& hosted) const
+{
+    if (!needsRun())
+        return;
+    DataModel& model = hosted.model();
+    const RestrictedRange restricted(model.settings(), *m_bounds);
+    const NothingCarried nothing(model.changeEdl());
+    hosted.apply();
+}
+
+const char* wordOf(core::CarriedFrom from)
+{
+    constexpr std::array Words{"cut", "unchanged", "hole", "black"};
+    return Words.at(static_cast<std::size_t>(from));
+}
+
+} // namespace cadrel::app

@@ -1,0 +1,62 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/edl/EventList.h"
+#include "core/keep/KeepPlan.h"
+#include "core/time/SecondsRange.h"
+
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace cadrel::core {
+class DataModel;
+} // namespace cadrel::core
+
+namespace standin {
+class Project;
+} // namespace standin
+
+namespace cadrel::app {
+
+class HostedProject;
+class ProjectClock;
+
+/// A run that leaves alone what the new cut doesn't speak of: it is planned first, and then restricted to the stretch that
+/// has to change.
+class KeptRun {
+public:
+    /// Where the change EDL of the model is from.
+    enum class Source { Generated, Given };
+
+    /// Plans the run of the model's change list, and puts the list that is carried out into the model when the list was
+    /// generated. Throws Failure where the user has to decide first, unless forced; `inputs` names the EDLs.
+    KeptRun(core::DataModel& model, const standin::Project& project, const ProjectClock& clock, Source source,
+            bool isForced, const std::string& inputs);
+
+    bool needsRun() const { return m_bounds.has_value(); }
+    /// What may change, in seconds of the project's clock. The run is needed.
+    const core::SecondsRange& bounds() const { return *m_bounds; }
+    /// Does what has to be done. Afterwards the settings are as they were, whatever happens. Throws as
+    /// HostedProject::apply.
+    void apply(HostedProject& hosted) const;
+
+    const core::KeepPlan& plan() const { return m_plan; }
+    /// All that has old sound in the new programme: the list that is carried out, and what stays. Empty for a given list.
+    const core::EventList& carried() const { return m_carried; }
+    /// What would move, but lies outside of what the user lets change.
+    const core::EventList& outside() const { return m_outside; }
+
+private:
+    core::KeepPlan m_plan;
+    std::optional<core::SecondsRange> m_bounds;
+    core::EventList m_carried;
+    core::EventList m_outside;
+};
+
+/// The word of a report for where a stretch is from: "cut", "unchanged", "hole" or "black".
+const char* wordOf(core::CarriedFrom from);
+
+} // namespace cadrel::app

@@ -1,0 +1,802 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What the picture didn't change stays: the laws of a run through the whole program.
+
+#include "standin/changes/ChangeLog.h"
+#include "standin/file/ProjectFile.h"
+#include "tests/app/Film.h"
+#include "tests/app/ProgramRun.h"
+#include "tests/support/TreePaths.h"
+#include "tests/support/core/TreeEdls.h"
+#include "tests/support/standin/RandomProject.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <cstdio>
+#include <gtest/gtest.h>
+#include <map>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <vector>
+
+namespace {
+
+using namespace cadrel::tests;
+using nlohmann::json;
+
+using Words = std::vector<std::string>;
+
+constexpr double Hour = 3600.0;
+
+/// Seconds as a timecode at 24 frames a second.
+std::string timecode(double seconds)
+{
+    const int frames = static_cast<int>(std::lround(seconds * 24));
+    std::array<char, 40> text{};
+    std::snprintf(text.data(), text.size(), "%02d:%02d:%02d:%02d", frames / 86400, frames / 1440 % 60, frames / 24 % 60,
+                  frames % 24);
+    return text.data();
+}
+
+/// A cut that is put together shot by shot, in seconds of the day.
+class Reel {
+public:
+    explicit Reel(double start) : m_end(start) {}
+
+    Reel& shot(const std::string& roll, double source, double length)
+    {
+        add(roll, source, source + length, length);
+        return *this;
+    }
+    Reel& freeze(const std::string& roll, double source, double length)
+    {
+        add(roll, source, source, length);
+        return *this;
+    }
+    Reel& at(double seconds)
+    {
+        m_end = seconds;
+        return *this;
+    }
+    const std::string& text() const { return m_text; }
+
+private:
+    void add(const std::string& roll, double in, double out, double length)
+    {
+        std::array<char, 16> number{};
+        std::snprintf(number.data(), number.size(), "%03d", ++m_count);
+        m_text += cut(number.data(), roll, timecode(in) + " " + timecode(out),
+                      timecode(m_end) + " " + timecode(m_end + length));
+        m_end += length;
+    }
+
+    std::string m_text = "TITLE: REEL\n";
+    double m_end;
+    int m_count = 0;
+};
+
+json clip(const std::string& name, double start, double end)
+{
+    return {{"kind", "clip"}, {"start", start}, {"end", end}, {"clip", 1}, {"name", name}};
+}
+
+json audioTrack(const std::string& name, const std::vector<json>& events)
+{
+    return {{"kind", "audio"}, {"name", name}, {"events", events}};
+}
+
+/// A project at 24 frames a second with those tracks.
+std::string projectOf(const json& tracks, double origin = 0.0)
+{
+    const json pool =
+        json::array({{{"number", 1}, {"kind", "audio"}, {"name", "take"}, {"path", "take.wav"}, {"length", 90000}}});
+    const json project{{"format", "stage"},   {"version", 1},         {"framesPerSecond", 24}, {"dropFrame", false},
+                       {"pulledDown", false}, {"timeOrigin", origin}, {"end", 90000},          {"position", 0},
+                       {"leftLocator", 0},    {"rightLocator", 0},    {"cycleStart", 0},       {"cycleEnd", 0},
+                       {"pool", pool},        {"tracks", tracks}};
+    return project.dump();
+}
+
+bool tells(const std::string& text, const std::string& piece)
+{
+    return text.find(piece) != std::string::npos;
+}
+
+json tracksIn(const std::filesystem::path& project)
+{
+    return json::parse(contentOf(project)).at("tracks");
+}
+
+json trackIn(const std::filesystem::path& project, const std::string& name)
+{
+    for (const json& track : tracksIn(project)) {
+        if (track.at("name") == name)
+            return track;
+    }
+    return {};
+}
+
+/// "name start-end" of what lies on a track.
+Words placesOn(const std::string& track, const std::filesystem::path& project)
+{
+    Words places;
+    for (const json& event : trackIn(project, track).value("events", json::array())) {
+        std::array<char, 80> text{};
+        std::snprintf(text.data(), text.size(), " %g-%g", event.at("start").get<double>(),
+                      event.value("end", event.at("start").get<double>()));
+        places.push_back(event.value("name", std::string()) + text.data());
+    }
+    return places;
+}
+
+/// The files of a run.
+struct Job {
+    Job(const Reel& oldReel, const Reel& newReel, const json& tracks, double origin = 0.0)
+        : oldFile(folder.write("old.edl", oldReel.text())), newFile(folder.write("new.edl", newReel.text())),
+          project(folder.write("job.stage", projectOf(tracks, origin))), result(folder / "result.stage")
+    {
+    }
+
+    Outcome run(const Words& more = {}) const
+    {
+        Words words{"apply", project, "--old", oldFile, "--new", newFile, "-o", result};
+        words.insert(words.end(), more.begin(), more.end());
+        return runCadrel(words);
+    }
+    json report(Words more = {}) const
+    {
+        more.insert(more.end(), {"--json", "-"});
+        const Outcome outcome = run(more);
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return outcome.status == 0 ? json::parse(outcome.out) : json();
+    }
+
+    const TempFolder folder;
+    const std::string oldFile;
+    const std::string newFile;
+    const std::string project;
+    const std::string result;
+};
+
+/// Three shots of ten seconds from 01:00:00:00 on.
+Reel threeShots()
+{
+    return Reel(Hour).shot("A", 100, 10).shot("B", 200, 10).shot("C", 300, 10);
+}
+
+/// The same after four seconds of a new shot between A and B.
+Reel withInsert()
+{
+    return Reel(Hour).shot("A", 100, 10).shot("N", 50, 4).shot("B", 200, 10).shot("C", 300, 10);
+}
+
+/// Sound under all of it, with a pop before and a tail behind.
+json soundOfThreeShots()
+{
+    return json::array({audioTrack("DIA", {clip("pop", Hour - 2, Hour - 1), clip("a", Hour, Hour + 10),
+                                           clip("b", Hour + 10, Hour + 20), clip("c", Hour + 20, Hour + 30),
+                                           clip("tail", Hour + 31, Hour + 33)})});
+}
+
+std::string randomText(std::uint64_t seed, const cadrel::core::Framerate& framerate)
+{
+    standin::ChangeLog log;
+    standin::tests::SeededChance chance(seed);
+    json project = json::parse(standin::ProjectFile::toText(*standin::tests::randomProject(chance, log)));
+    project["framesPerSecond"] = framerate.framesPerSecond;
+    project["dropFrame"] = framerate.dropFrame == 1;
+    project["pulledDown"] = framerate.pulledDown;
+    return project.dump();
+}
+
+TEST(Keep, EveryEdlOfTheTreeOntoItselfChangesNoTrackOfAnyProject)
+{
+    const TempFolder folder;
+    std::uint64_t seed = 1;
+    std::size_t applied = 0;
+    for (const std::string& path : treeEdls()) {
+        SCOPED_TRACE(path);
+        const TreeEdl edl(path);
+        if (!edl.events().hasReadableEvent())
+            continue;
+        const auto project = folder.write("random.stage", randomText(seed++, edl.framerate()));
+        const auto result = folder / "result.stage";
+
+        const Outcome outcome = runCadrel({"apply", project, "--old", treePath(path), "--new", treePath(path),
+                                           "--force", "-o", result, "--json", "-"});
+
+        if (outcome.status != 0) {
+            // What can't be generated is refused, and so changes nothing either.
+            EXPECT_FALSE(std::filesystem::exists(result)) << outcome.err;
+            continue;
+        }
+        ++applied;
+        EXPECT_FALSE(json::parse(outcome.out).at("runNeeded").get<bool>());
+        EXPECT_EQ(tracksIn(result), tracksIn(project));
+        std::filesystem::remove(result);
+    }
+    EXPECT_GT(applied, 15U);
+}
+
+TEST(Keep, ACutOntoItselfStoresTheModelAlone)
+{
+    for (std::uint64_t seed = 100; seed < 130; ++seed) {
+        SCOPED_TRACE(seed);
+        const Job job(threeShots(), threeShots(), json::array());
+        writeFile(job.project, randomText(seed, cadrel::core::Framerate(24, 0)));
+
+        const Outcome outcome = job.run({"--force"});
+
+        ASSERT_EQ(outcome.status, 0) << outcome.err;
+        EXPECT_TRUE(tells(outcome.out, "Applied     nothing, since no track has to change\n")) << outcome.out;
+        EXPECT_EQ(tracksIn(job.result), tracksIn(job.project));
+        EXPECT_NE(contentOf(job.result), contentOf(job.project));
+    }
+}
+
+/// The value of a curve at a time, straight between its points.
+double valueAt(const json& points, double time)
+{
+    const json* before = nullptr;
+    for (const json& point : points) {
+        const double at = point.at("time");
+        if (at >= time) {
+            if (!before)
+                return point.at("value");
+            const double from = before->at("time");
+            const double share = at > from ? (time - from) / (at - from) : 1.0;
+            return before->at("value").get<double>() +
+                   share * (point.at("value").get<double>() - before->at("value").get<double>());
+        }
+        before = &point;
+    }
+    return before ? before->at("value").get<double>() : 0.0;
+}
+
+TEST(Keep, BeforeOneChangeNothingMovesAndAfterItEverythingByTheSame)
+{
+    for (const double origin : {0.0, Hour - 10, -17.25}) {
+        SCOPED_TRACE(origin);
+        const double film = Hour - origin;
+        json sound = audioTrack("DIA", {clip("pop", film - 2, film - 1), clip("a", film, film + 9.7),
+                                        clip("b", film + 10.3, film + 20), clip("tail", film + 30.5, film + 31.1)});
+        sound["events"].push_back({{"kind", "part"},
+                                   {"name", "outer"},
+                                   {"start", film + 21.3},
+                                   {"end", film + 28},
+                                   {"events", json::array({{{"kind", "part"},
+                                                            {"name", "inner"},
+                                                            {"start", 1.5},
+                                                            {"end", 4},
+                                                            {"events", json::array({clip("deep", 0.25, 1)})}}})}});
+        std::swap(sound["events"][3], sound["events"][4]);
+        sound["curves"] = json::array({{{"number", 1},
+                                        {"automates", "volume"},
+                                        {"points", json::array({{{"time", film + 1}, {"value", 0.25}},
+                                                                {{"time", film + 8}, {"value", 0.75}},
+                                                                {{"time", film + 13}, {"value", 0.5}},
+                                                                {{"time", film + 25}, {"value", 0.125}}})}}});
+        json locked = audioTrack("Guide", {clip("guide", film, film + 30)});
+        locked["locked"] = true;
+        const json memos{
+            {"kind", "marker"},
+            {"name", "Notes"},
+            {"events",
+             json::array({{{"kind", "point"}, {"start", film + 3}, {"name", "here"}},
+                          {{"kind", "range"}, {"start", film + 14}, {"end", film + 16}, {"name", "there"}}})}};
+        const Job job(threeShots(), withInsert(), json::array({sound, locked, memos}), origin);
+
+        const json report = job.report();
+
+        EXPECT_TRUE(report.at("runNeeded").get<bool>());
+        const json before = trackIn(job.project, "DIA");
+        const json after = trackIn(job.result, "DIA");
+        ASSERT_EQ(after.at("events").size(), 5U);
+        for (const std::size_t index : {0U, 1U})
+            EXPECT_EQ(after["events"][index], json::parse(contentOf(job.project))["tracks"][0]["events"][index]);
+        for (const std::size_t index : {2U, 3U, 4U}) {
+            const json& was = before["events"][index];
+            const json& now = after["events"][index];
+            EXPECT_EQ(now.at("name"), was.at("name"));
+            EXPECT_NEAR(now.at("start").get<double>(), was.at("start").get<double>() + 4, 1.0 / 384000);
+            EXPECT_NEAR(now.at("end").get<double>(), was.at("end").get<double>() + 4, 1.0 / 384000);
+        }
+        const json& inner = after["events"][3]["events"][0];
+        EXPECT_NEAR(inner.at("start").get<double>(), 1.5, 1.0 / 384000);
+        EXPECT_EQ(inner["events"][0].at("name"), "deep");
+        const json& wasCurve = before["curves"][0]["points"];
+        const json& nowCurve = after["curves"][0]["points"];
+        for (const double time : {0.0, 1.0, 4.5, 8.0, 9.5})
+            EXPECT_NEAR(valueAt(nowCurve, film + time), valueAt(wasCurve, film + time), 1e-6) << time;
+        for (const double time : {10.5, 13.0, 19.0, 25.0, 29.0, 31.0})
+            EXPECT_NEAR(valueAt(nowCurve, film + time + 4), valueAt(wasCurve, film + time), 1e-6) << time;
+        EXPECT_EQ(trackIn(job.result, "Guide"), trackIn(job.project, "Guide"));
+        const json notes = trackIn(job.result, "Notes");
+        EXPECT_EQ(notes["events"][0], trackIn(job.project, "Notes")["events"][0]);
+        EXPECT_NEAR(notes["events"][1].at("start").get<double>(), film + 18, 1.0 / 384000);
+    }
+}
+
+/// The tracks of a project whose content a run may change, those in folders too; without those that runs write on.
+std::vector<json> changeableTracks(const json& tracks)
+{
+    std::vector<json> found;
+    for (const json& track : tracks) {
+        if (track.at("kind") == "folder") {
+            for (const json& inner : changeableTracks(track.value("tracks", json::array())))
+                found.push_back(inner);
+        } else if (track.at("kind") != "ruler" && track.value("name", std::string()) != "Destination" &&
+                   track.value("name", std::string()) != "Insert") {
+            found.push_back(track);
+        }
+    }
+    return found;
+}
+
+double endOf(const json& event)
+{
+    return event.value("end", event.at("start").get<double>());
+}
+
+/// Whether a list holds the event, as much later as `shift`; 0 means to the last bit.
+bool holds(const json& events, const json& event, double shift)
+{
+    const auto isSame = [&](const json& other) {
+        if (shift == 0.0)
+            return other == event;
+        json moved = other;
+        moved["start"] = event.at("start");
+        if (event.contains("end"))
+            moved["end"] = event.at("end");
+        constexpr double SameInstant = 1.0 / 384000;
+        return moved == event &&
+               std::abs(other.at("start").get<double>() - event.at("start").get<double>() - shift) < SameInstant &&
+               std::abs(endOf(other) - endOf(event) - shift) < SameInstant;
+    };
+    return std::any_of(events.begin(), events.end(), isSame);
+}
+
+TEST(Keep, InRandomProjectsOneChangeLeavesWhatIsBeforeItAndShiftsWhatIsAfter)
+{
+    constexpr double Change = 40;
+    constexpr double Added = 4;
+    const Reel before = Reel(Hour).shot("A", 100, Change).shot("B", 1000, 200);
+    const Reel after = Reel(Hour).shot("A", 100, Change).shot("N", 50, Added).shot("B", 1000, 200);
+    std::size_t stayed = 0;
+    std::size_t moved = 0;
+    for (std::uint64_t seed = 200; seed < 320; ++seed) {
+        SCOPED_TRACE(seed);
+        const Job job(before, after, json::array());
+        json project = json::parse(randomText(seed, cadrel::core::Framerate(24, 0)));
+        project["timeOrigin"] = Hour;
+        writeFile(job.project, project.dump());
+
+        const Outcome outcome = job.run({"--force"});
+
+        if (tells(outcome.err, "has no tracks that a run could change"))
+            continue;
+        ASSERT_EQ(outcome.status, 0) << outcome.err;
+        const std::vector<json> tracksBefore = changeableTracks(tracksIn(job.project));
+        const std::vector<json> tracksAfter = changeableTracks(tracksIn(job.result));
+        ASSERT_GE(tracksAfter.size(), tracksBefore.size());
+        for (std::size_t index = 0; index < tracksBefore.size(); ++index) {
+            const json& was = tracksBefore[index];
+            const json now = tracksAfter[index].value("events", json::array());
+            if (was.value("locked", false)) {
+                EXPECT_EQ(tracksAfter[index], was);
+                continue;
+            }
+            for (const json& event : was.value("events", json::array())) {
+                if (endOf(event) < Change) {
+                    EXPECT_TRUE(holds(now, event, 0.0)) << event;
+                    ++stayed;
+                } else if (event.at("start").get<double>() > Change) {
+                    EXPECT_TRUE(holds(now, event, Added)) << event;
+                    ++moved;
+                }
+            }
+        }
+    }
+    EXPECT_GT(stayed, 100U);
+    EXPECT_GT(moved, 100U);
+}
+
+TEST(Keep, PopAndTailFollowTheirOwnReelAndOtherReelsStay)
+{
+    // The first reel gets four seconds longer; the second begins at its own hour and is trimmed at its head.
+    Reel oldReels = threeShots();
+    oldReels.at(2 * Hour).shot("D", 400, 10).shot("E", 500, 10);
+    Reel newReels = withInsert();
+    newReels.at(2 * Hour).shot("D", 402, 8).shot("E", 500, 10);
+    json sound = soundOfThreeShots();
+    for (const json& more : {clip("pop 2", 2 * Hour - 2, 2 * Hour - 1), clip("d", 2 * Hour + 2, 2 * Hour + 10),
+                             clip("e", 2 * Hour + 10, 2 * Hour + 20), clip("tail 2", 2 * Hour + 21, 2 * Hour + 22),
+                             clip("reel 3", 3 * Hour, 3 * Hour + 5)})
+        sound[0]["events"].push_back(more);
+    const Job job(oldReels, newReels, sound);
+
+    EXPECT_EQ(job.run().status, 0);
+
+    EXPECT_EQ(placesOn("DIA", job.result),
+              (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3624", "c 3624-3634", "tail 3635-3637", "pop 2 7198-7199",
+                     "d 7200-7208", "e 7208-7218", "tail 2 7219-7220", "reel 3 10800-10805"}));
+}
+
+TEST(Keep, OfTheSmallExampleEachReelMovesWithItsPopAndItsTail)
+{
+    const TempFolder folder;
+    const std::string example = treePath("examples/tworeels/");
+    const auto result = folder / "result.stage";
+
+    const Outcome outcome = runCadrel({"apply", example + "tworeels.stage", "--old", example + "old.edl", "--new",
+                                       example + "new.edl", "-o", result});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.err, "");
+    // In seconds from 00:59:00:00 on.
+    EXPECT_EQ(placesOn("FX", result),
+              (Words{"leader 52-57", "2-pop 58-58.5", "pier 60-70", "lamp 74-84", "lamp goes out 84.5-85.5",
+                     "boat 86-96", "tail pop 98-98.5", "leader 2 3652-3657", "2-pop 2 3658-3658.5", "stairs 3660-3670",
+                     "door 3670-3678", "tail pop 2 3680-3680.5"}));
+    // Its page shows the report as it is.
+    const std::string moves = outcome.out.substr(outcome.out.find("FX (audio)\n  was in"));
+    EXPECT_TRUE(tells(contentOf(example + "README.md"), moves.substr(0, moves.find("\n\n")))) << moves;
+}
+
+TEST(Keep, TheReportHoldsWhereEachStretchOfTheListIsFrom)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+
+    const json report = job.report();
+
+    ASSERT_EQ(report.at("events").size(), 1U);
+    EXPECT_EQ(report["events"][0].at("srcIn"), "01:00:10:00");
+    EXPECT_EQ(report["events"][0].at("dstIn"), "01:00:14:00");
+    Words from;
+    for (const json& part : report["events"][0].at("parts"))
+        from.push_back(part.at("srcIn").get<std::string>() + " " + part.at("from").get<std::string>());
+    ASSERT_GE(from.size(), 2U);
+    EXPECT_EQ(from.front(), "01:00:10:00 cut");
+    EXPECT_EQ(from.back(), "01:00:30:00 black");
+    // What stays is covered, though it stands in no event: 30 of 34 seconds.
+    EXPECT_EQ(report.at("programmeFrames"), 34 * 24);
+    EXPECT_EQ(report.at("coveredFrames"), 30 * 24);
+    EXPECT_EQ(report.at("lost"), json::array());
+}
+
+TEST(Keep, AReplacedShotLosesItsSoundThoughTheListToCarryOutIsEmpty)
+{
+    const Reel replaced = Reel(Hour).shot("A", 100, 10).shot("N", 50, 10).shot("C", 300, 10);
+    const Job job(threeShots(), replaced, soundOfThreeShots());
+
+    const json report = job.report();
+
+    EXPECT_TRUE(report.at("runNeeded").get<bool>());
+    EXPECT_EQ(report.at("events"), json::array());
+    EXPECT_EQ(report.at("applied"), 0);
+    EXPECT_EQ(placesOn("DIA", job.result), (Words{"pop 3598-3599", "a 3600-3610", "c 3620-3630", "tail 3631-3633"}));
+    ASSERT_EQ(report.at("markers").size(), 1U) << report.at("markers");
+    EXPECT_EQ(report["markers"][0].at("kind"), "Insert");
+    EXPECT_EQ(report["markers"][0].at("in").at("timecode"), "01:00:10:00");
+    EXPECT_EQ(report["markers"][0].at("out").at("timecode"), "01:00:20:00");
+}
+
+TEST(Keep, AFilmOfFreezesIsKeptThoughTheChangeEdlIsEmpty)
+{
+    const Reel stills = Reel(Hour).freeze("A", 100, 10).freeze("B", 200, 10);
+    const Job job(stills, stills, json::array({audioTrack("DIA", {clip("a", Hour, Hour + 20)})}));
+
+    const json report = job.report();
+
+    EXPECT_FALSE(report.at("runNeeded").get<bool>());
+    EXPECT_EQ(tracksIn(job.result), tracksIn(job.project));
+    const Outcome cutAlone = job.run({"--keep", "cut"});
+    EXPECT_EQ(cutAlone.status, 1);
+    EXPECT_TRUE(tells(cutAlone.err, "nothing of the old cut survives in the new one")) << cutAlone.err;
+}
+
+TEST(Keep, TheChangeEdlAloneCountsWhereThatIsAskedFor)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+
+    EXPECT_EQ(job.run({"--keep", "cut"}).status, 0);
+
+    EXPECT_EQ(placesOn("DIA", job.result), (Words{"a 3600-3610", "b 3614-3624", "c 3624-3634"}));
+}
+
+TEST(Keep, TheRangeThatTheUserPreservesIsStoredAndNotThatOfTheRun)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+
+    const Outcome without = job.run();
+    EXPECT_FALSE(tells(without.out, "alone")) << without.out;
+    const Outcome again = runCadrel({"apply", job.result, "--old", job.newFile, "--new", job.newFile});
+    EXPECT_FALSE(tells(again.out, "alone")) << again.out << again.err;
+
+    const Outcome with = job.run({"--preserve", "01:00:00:00", "01:00:20:00"});
+    EXPECT_TRUE(tells(with.out, "Settings    between 01:00:00:00 and 01:00:20:00 alone\n")) << with.out;
+    // Up to 20 the run changes what has moved; "c" stays where it was.
+    EXPECT_EQ(placesOn("DIA", job.result),
+              (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3620", "c 3620-3630", "tail 3631-3633"}));
+}
+
+TEST(Keep, OutsideOfTheHullOfAGivenChangeEdlNothingIsTouched)
+{
+    // The two halves of B change places.
+    const Job job(threeShots(), threeShots(), soundOfThreeShots());
+    const auto change = job.folder.write(
+        "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:15:00 01:00:20:00", "01:00:10:00 01:00:15:00") +
+                          cut("002", "B", "01:00:10:00 01:00:15:00", "01:00:15:00 01:00:20:00"));
+
+    const Outcome outcome = runCadrel({"apply", job.project, "--change", change, "-o", job.result});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(placesOn("DIA", job.result),
+              (Words{"pop 3598-3599", "a 3600-3610", "b 3610-3615", "b 3615-3620", "c 3620-3630", "tail 3631-3633"}));
+    const json events = trackIn(job.result, "DIA").at("events");
+    EXPECT_EQ(events[2].at("offset"), 5.0);
+    EXPECT_EQ(events[1], trackIn(job.project, "DIA").at("events")[1]);
+}
+
+TEST(Keep, WhatStandsInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
+{
+    const Job job(threeShots(), threeShots(), soundOfThreeShots());
+    const auto change = job.folder.write(
+        "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:10:00 01:00:20:00", "01:00:14:00 01:00:24:00"));
+
+    const Outcome refused = runCadrel({"apply", job.project, "--change", change, "-o", job.result});
+
+    EXPECT_EQ(refused.status, 1);
+    EXPECT_EQ(refused.err, "cadrel: " + change.string() +
+                               ": 00:00:04:00 of sound or markers, from 01:00:20:00 on, stand where the change EDL "
+                               "puts its stretches; make room for them, or give --force to let the cut win\n");
+    EXPECT_FALSE(std::filesystem::exists(job.result));
+    const Outcome forced = runCadrel({"apply", job.project, "--change", change, "--force", "-o", job.result});
+    EXPECT_EQ(forced.status, 0) << forced.err;
+    EXPECT_TRUE(tells(forced.out, "Lost        01:00:20:00 - 01:00:24:00, for want of room\n")) << forced.out;
+    EXPECT_EQ(placesOn("DIA", job.result),
+              (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3624", "c 3624-3630", "tail 3631-3633"}));
+}
+
+TEST(Keep, UnequalNumbersOfReelsAreAQuestion)
+{
+    Reel oldReels = threeShots();
+    oldReels.at(2 * Hour).shot("D", 400, 10);
+    const Job job(oldReels, threeShots(), json::array({audioTrack("DIA", {clip("all", Hour, 2 * Hour + 10)})}));
+
+    const Outcome outcome = job.run();
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(tells(outcome.err,
+                      "the old cut has 2 reels (01:00:00:00 - 01:00:30:00, 02:00:00:00 - 02:00:10:00), and "
+                      "the new cut has 1 reel (01:00:00:00 - 01:00:30:00)"))
+        << outcome.err;
+    EXPECT_FALSE(std::filesystem::exists(job.result));
+    EXPECT_EQ(job.run({"--force"}).status, 0);
+}
+
+TEST(Keep, MaterialPastTheDayThatWouldHaveToMoveIsRefusedUnlessItsTrackStays)
+{
+    const double late = 24 * Hour - 40;
+    const Reel before = Reel(late).shot("A", 100, 10).shot("B", 200, 20);
+    const Reel after = Reel(late).shot("A", 100, 10).shot("N", 50, 4).shot("B", 200, 20);
+    json sound = audioTrack("DIA", {clip("a", late, late + 30), clip("tail", late + 35, late + 45)});
+    const Job job(before, after, json::array({sound}));
+
+    const Outcome outcome = job.run({"--force"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(
+        tells(outcome.err, "no timecode of a day names their place; move them into the day, or lock their tracks"))
+        << outcome.err;
+    sound["locked"] = true;
+    writeFile(job.project, projectOf(json::array({sound, audioTrack("FX", {clip("b", late, late + 30)})})));
+    EXPECT_EQ(job.run().status, 0);
+    EXPECT_EQ(trackIn(job.result, "DIA"), trackIn(job.project, "DIA"));
+}
+
+TEST(Keep, OfTracksThatAreNotSelectedNothingCounts)
+{
+    const double late = 24 * Hour - 40;
+    const Reel before = Reel(late).shot("A", 100, 10).shot("B", 200, 20);
+    const Reel after = Reel(late).shot("A", 100, 10).shot("N", 50, 4).shot("B", 200, 20);
+    json selected = audioTrack("DIA", {clip("a", late, late + 30)});
+    selected["selected"] = true;
+    const json other = audioTrack("FX", {clip("tail", late + 35, late + 45)});
+    const Job job(before, after, json::array({selected, other}));
+
+    EXPECT_EQ(job.run({"--tracks", "selected"}).status, 0);
+
+    EXPECT_EQ(trackIn(job.result, "FX"), trackIn(job.project, "FX"));
+}
+
+TEST(Keep, ATailThatFindsNoRoomIsToldAsLost)
+{
+    // The tail of the first reel fills the gap to the second, which gets ten seconds shorter.
+    const Reel before = Reel(Hour).shot("A", 100, 10).at(Hour + 80).shot("B", 200, 10);
+    const Reel after = Reel(Hour).shot("A", 100, 10).at(Hour + 70).shot("B", 200, 10);
+    const Job job(before, after, json::array({audioTrack("DIA", {clip("a", Hour, Hour + 90)})}));
+
+    const json report = job.report();
+
+    ASSERT_EQ(report.at("lost").size(), 1U);
+    EXPECT_EQ(report["lost"][0].at("in").at("timecode"), "01:01:10:00");
+    EXPECT_EQ(report["lost"][0].at("out").at("timecode"), "01:01:20:00");
+}
+
+/// Whether a run is refused with those words, writes nothing, and goes on when it is forced.
+void expectDoubt(const Job& job, const std::string& words)
+{
+    const Outcome outcome = job.run();
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_TRUE(tells(outcome.err, words)) << outcome.err;
+    EXPECT_FALSE(std::filesystem::exists(job.result));
+    const Outcome forced = job.run({"--force"});
+    EXPECT_EQ(forced.status, 0) << forced.err;
+}
+
+TEST(Plausibility, TheSameRunTwiceIsRefused)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    ASSERT_EQ(job.run().status, 0);
+    std::filesystem::rename(job.result, job.project);
+
+    expectDoubt(job, "was last carried over to another cut than the old one given; they differ first at 01:00:10:00");
+}
+
+TEST(Plausibility, ReelTwoAfterReelOneIsNoDoubt)
+{
+    json sound = soundOfThreeShots();
+    sound[0]["events"].push_back(clip("d", 2 * Hour, 2 * Hour + 20));
+    const Job job(threeShots(), withInsert(), sound);
+    ASSERT_EQ(job.run().status, 0);
+    const auto oldFile = job.folder.write("old2.edl", Reel(2 * Hour).shot("D", 400, 10).shot("E", 500, 10).text());
+    const auto newFile = job.folder.write("new2.edl", Reel(2 * Hour).shot("D", 400, 10).shot("E", 502, 8).text());
+
+    const Outcome outcome = runCadrel({"apply", job.result, "--old", oldFile, "--new", newFile});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+}
+
+TEST(Plausibility, CutsWithoutACommonNameAreRefused)
+{
+    expectDoubt({threeShots(), Reel(Hour).shot("X", 100, 10).shot("Y", 200, 10), soundOfThreeShots()},
+                "the old and the new cut have no name in common; see that both are of one reel, try --match or --vfx");
+}
+
+TEST(Plausibility, LessThanHalfThatSurvivesIsRefused)
+{
+    // 15 of 30 seconds are half, a frame less isn't.
+    const auto half = Reel(Hour).shot("A", 100, 10).shot("B", 200, 5).shot("N", 0, 15);
+    EXPECT_EQ(Job(threeShots(), half, soundOfThreeShots()).run().status, 0);
+
+    const auto less = Reel(Hour).shot("A", 100, 10).shot("B", 200, 5 - 1.0 / 24).shot("N", 0, 15);
+    expectDoubt({threeShots(), less, soundOfThreeShots()},
+                "only 00:00:14:23 of the 00:00:30:00 of the old cut survive");
+}
+
+TEST(Plausibility, LessThanHalfWithSoundIsRefused)
+{
+    const auto soundUpTo = [](double end) { return json::array({audioTrack("DIA", {clip("a", Hour, Hour + end)})}); };
+
+    EXPECT_EQ(Job(threeShots(), withInsert(), soundUpTo(15)).run().status, 0);
+    expectDoubt({threeShots(), withInsert(), soundUpTo(15 - 1.0 / 24)},
+                "has sound under 00:00:14:23 of the 00:00:30:00 of the old cut only");
+}
+
+TEST(Plausibility, NamesThatTellNothingAreWarnedOf)
+{
+    const auto film = [](const std::string& roll) {
+        return Reel(Hour).shot(roll, 100, 10).shot(roll, 200, 10).shot(roll, 300, 10);
+    };
+    const Outcome outcome = Job(film("AX"), film("AX"), soundOfThreeShots()).run();
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_TRUE(tells(outcome.err, "6 of 6 events have the roll name AX, which doesn't tell one material from another; "
+                                   "try --match clip\n"))
+        << outcome.err;
+    EXPECT_TRUE(tells(outcome.out, "Match       roll names that tell the material: 0 of 6 events, 0 %\n"))
+        << outcome.out;
+}
+
+TEST(Plausibility, OneNameForHalfOfTheEventsIsWarnedOf)
+{
+    const auto film = [](int sameNames) {
+        Reel reel(Hour);
+        for (int shot = 0; shot < 4; ++shot)
+            reel.shot(shot < sameNames ? std::string("SAME") : std::string("R").append(std::to_string(shot)),
+                      100.0 * (shot + 1), 10);
+        return reel;
+    };
+    const json sound = json::array({audioTrack("DIA", {clip("a", Hour, Hour + 40)})});
+
+    const Outcome half = Job(film(2), film(2), sound).run();
+    EXPECT_TRUE(tells(half.err, "4 of 8 events have the roll name SAME")) << half.err;
+    EXPECT_TRUE(tells(half.out, "Match       roll names that tell the material: 4 of 8 events, 50 %\n")) << half.out;
+    EXPECT_EQ(Job(film(2), film(1), sound).run().err, "");
+}
+
+/// Two files of one cut that both begin at 01:00:00:00.
+struct TwoReels {
+    const TempFolder folder;
+    const std::string first = folder.write("r1.edl", Reel(Hour).shot("A", 100, 10).shot("B", 200, 10).text());
+    const std::string second = folder.write("r2.edl", Reel(Hour).shot("C", 300, 10).shot("D", 400, 10).text());
+    const std::string project = folder.write(
+        "job.stage",
+        projectOf(json::array({audioTrack("DIA", {clip("1", Hour, Hour + 20), clip("2", 2 * Hour, 2 * Hour + 20)})})));
+};
+
+TEST(Shift, FilesOfOneCutOnTheSameTimecodeAreRefusedWithTheShiftThatPartsThem)
+{
+    const TwoReels reels;
+    Words words{"apply", reels.project, "--old", reels.first, reels.second, "--new", reels.first, reels.second};
+
+    const Outcome refused = runCadrel(words);
+
+    EXPECT_EQ(refused.status, 1);
+    EXPECT_EQ(refused.err, "cadrel: " + reels.second +
+                               ": lies on the same timecode as another file of its cut; give --shift "
+                               "r2.edl=+01:00:00:00\n");
+    words.insert(words.end(), {"--shift", "r2.edl=+01:00:00:00"});
+    const Outcome parted = runCadrel(words);
+    EXPECT_EQ(parted.status, 0) << parted.err;
+    EXPECT_EQ(parted.err, "");
+}
+
+TEST(Shift, AtTheEndOfTheDayFilesArePartedBackwards)
+{
+    const TempFolder folder;
+    const auto first = folder.write("r1.edl", Reel(23 * Hour).shot("A", 100, 10).text());
+    const auto second = folder.write("r2.edl", Reel(23 * Hour).shot("B", 100, 10).text());
+
+    const Outcome outcome = runCadrel({"generate", "--rate", "24 fps", "--old", first, second, "--new", first});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_TRUE(tells(outcome.err, "give --shift r2.edl=-01:00:00:00")) << outcome.err;
+}
+
+TEST(Shift, MovesTheTimecodesOfItsFileAloneInEveryCommand)
+{
+    const TwoReels reels;
+
+    const Outcome list = runCadrel({"list", "--rate", "24 fps", reels.first, reels.second, "--shift",
+                                    reels.second + "=-00:30:00:12", "--json", "-"});
+
+    ASSERT_EQ(list.status, 0) << list.err;
+    const json events = json::parse(list.out).at("events");
+    EXPECT_EQ(events[0].at("dstIn"), "01:00:00:00");
+    EXPECT_EQ(events[2].at("dstIn"), "00:29:59:12");
+    EXPECT_EQ(events[2].at("srcIn"), "00:05:00:00");
+    EXPECT_EQ(events[3].at("dstOut"), "00:30:19:12");
+    const Outcome generate = runCadrel({"generate", "--rate", "24 fps", "--old", reels.first, "--new", reels.second,
+                                        reels.first, "--shift", "r2.edl=+02:00:00:00", "--json", "-"});
+    ASSERT_EQ(generate.status, 0) << generate.err;
+    EXPECT_EQ(generate.err, "");
+    const Outcome notes = runCadrel({"notes", "--rate", "24 fps", "--old", reels.first, reels.second, "--new",
+                                     reels.first, reels.second, "--shift", "r2.edl=+02:00:00:00"});
+    EXPECT_EQ(notes.status, 0);
+    EXPECT_EQ(notes.err, "");
+}
+
+TEST(Shift, WhatIsNoShiftIsWrongUsage)
+{
+    const TwoReels reels;
+    const auto refusal = [&](const std::string& shift) {
+        const Outcome outcome = runCadrel({"list", "--rate", "24 fps", reels.first, reels.second, "--shift", shift});
+        EXPECT_EQ(outcome.status, 2) << shift;
+        return outcome.err;
+    };
+
+    EXPECT_TRUE(tells(refusal("r2.edl"), "has no timecode after the file"));
+    EXPECT_TRUE(tells(refusal("r2.edl=01:00:00:00"), "has no + or - and timecode"));
+    EXPECT_TRUE(tells(refusal("r2.edl=+1 hour"), "has no + or - and timecode"));
+    EXPECT_TRUE(tells(refusal("r3.edl=+01:00:00:00"), "names no EDL of this run"));
+    const Outcome beyond = runCadrel({"list", "--rate", "24 fps", reels.first, "--shift", "r1.edl=-01:00:00:01"});
+    EXPECT_EQ(beyond.status, 1);
+    EXPECT_TRUE(tells(beyond.err, "would leave the 24 hours of a day")) << beyond.err;
+    EXPECT_EQ(runCadrel({"list", "--rate", "24 fps", reels.first, "--shift", "r1.edl=-01:00:00:00"}).status, 0);
+}
+
+} // namespace
