@@ -167,6 +167,8 @@ private:
     Project* find(Velmark::IProjectDocument* document) const;
     void setCurrentProject(Project* project);
     void settleAfterUndo(Project& project);
+    /// The tracks of a preview that a redo has brought back, where its new place is looked at.
+    static void lockAgain(Project& project);
     static void showAlert(const std::wstring& message);
 
     // Runs and previews, in HostRuns.cpp.

@@ -272,7 +272,8 @@ Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTra
     if (m_transaction) {
         const Result::Type kept = resultOf([&] {
             if (previewed.events() != previewedBefore)
-                requireOk(m_transaction->addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get()));
+                requireOk(m_transaction->addStep(
+                    makeCounted<PreviewEventsStep>(m_currentProject->sharedPreviewEvents(), previewedBefore).get()));
         });
         // Otherwise a memo might be carried over to the wrong place.
         if (kept != Result::Ok)

@@ -219,6 +219,81 @@ TEST_P(HostPreviewTest, IsTakenBackWholeByAnUndo)
     EXPECT_EQ(host.contentOf(track), after);
 }
 
+TEST_P(HostPreviewTest, LocksTheTracksAgainWhenItIsRedone)
+{
+    const Node own = host.addTrack(TypeWord::Audio, u"Own");
+    query<ITrackNode>(own)->setFlag(TrackFlag::Lock, true);
+    host.settings().setCreateOverlapMarkers(true);
+    previewAll();
+    ASSERT_TRUE(host.undo());
+    ASSERT_FALSE(isLocked(track));
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_TRUE(isLocked(track));
+    EXPECT_TRUE(isLocked(host.trackNamed(u"Overlap")));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Memos")));
+
+    adapter().setPreviewActive(false);
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Overlap")));
+    EXPECT_TRUE(isLocked(own)) << "That is the user's lock.";
+}
+
+TEST_P(HostPreviewTest, LeavesTheTracksFreeWhenItIsRedoneWhereTheOldPlaceWasLookedAt)
+{
+    adapter().setPreviewActive(true);
+    host.preview(changes(), 0, 0, false);
+    ASSERT_TRUE(host.undo());
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_FALSE(isLocked(track));
+}
+
+TEST_P(HostPreviewTest, LocksTheTracksAgainWhenItsEndIsUndone)
+{
+    host.settings().setCreateOverlapMarkers(true);
+    previewAll();
+    adapter().setPreviewActive(false);
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_TRUE(isLocked(track));
+    EXPECT_TRUE(isLocked(host.trackNamed(u"Overlap")));
+
+    ASSERT_TRUE(host.redo());
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Overlap")));
+}
+
+TEST_P(HostPreviewTest, LeavesItsTracksFreeOfWhichARunWasRedone)
+{
+    previewAll();
+    host.conform();
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(host.redo());
+    ASSERT_TRUE(isLocked(track));
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostPreviewTest, HasUndoStepsThatOutliveTheAdapter)
+{
+    previewAll();
+    host.disconnect();
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+}
+
 TEST_P(HostPreviewTest, LeadsTheUserBackWhenItIsUndone)
 {
     for (const bool atDestination : {true, false}) {

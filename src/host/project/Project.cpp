@@ -252,7 +252,7 @@ void Project::onProjectEdited(IEditTransaction& transaction)
 
 MemoSync::Previewed Project::previewed() const
 {
-    return {m_previewEvents.events(), getFramerate(), requiredOffset()};
+    return {m_previewEvents->events(), getFramerate(), requiredOffset()};
 }
 
 void Project::syncMemos(IEditTransaction& transaction)

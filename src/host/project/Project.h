@@ -72,6 +72,8 @@ public:
     Velmark::IProjectDocument* document() const { return m_document; }
     Velmark::IHostContext* hostContext() const override { return m_hostContext; }
     core::DataModel& model() { return m_model; }
+    /// For those who may outlive the project, and hold it weakly.
+    const std::shared_ptr<core::DataModel>& sharedModel() const { return m_sharedModel; }
     MediaPool& mediaPool() { return m_mediaPool; }
 
     // Storage, as attributes of the host's project; in ProjectStorage.cpp.
@@ -161,7 +163,9 @@ public:
     void extendProjectEnd(bool active);
     core::CadrelRunState runState();
     core::CadrelPreviewState previewState();
-    core::EventList& previewEvents() { return m_previewEvents; }
+    core::EventList& previewEvents() { return *m_previewEvents; }
+    /// As with the model.
+    const std::shared_ptr<core::EventList>& sharedPreviewEvents() const { return m_previewEvents; }
     /// Not owned; null outside of a run.
     void setProgress(core::ProgressHandlerBase* progress) { m_progress = progress; }
 
@@ -228,10 +232,11 @@ private:
     Track m_folderTrack;
     /// Nothing while it isn't in use, and until it's filled.
     std::optional<std::vector<Velmark::Counted<Velmark::ITrackNode>>> m_trackCache;
-    core::DataModel m_model;
+    const std::shared_ptr<core::DataModel> m_sharedModel = std::make_shared<core::DataModel>();
+    core::DataModel& m_model = *m_sharedModel;
     Velmark::IHostContext* m_hostContext;
     mutable core::Framerate m_framerate; ///< unknown until it's read
-    core::EventList m_previewEvents{core::ListKind::Change};
+    const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;
