@@ -209,6 +209,8 @@ void Host::notify(const core::ChangeContext& context)
 /// place, and the next would take that for the user's own.
 void Host::settleAfterUndo(Project& project)
 {
+    // What an edit that failed has left there, is gone.
+    project.setLeftovers(false);
     FirstFailure failure;
     if (project.model().isPreviewActive() && !project.hasLockTracks())
         failure.ofStep([&] { lockAgain(project); });

@@ -194,7 +194,6 @@ private:
     void joinPieces(double start, double end);
     /// Makes sure that there is a preview offset, and throws what keeps a run from beginning.
     void prepareStart();
-    static void ensurePreviewOffset(Project& project);
     /// The one that is open.
     Velmark::IEditTransaction& openTransaction() const;
     void announce(const wchar_t* text);

@@ -164,8 +164,19 @@ void Project::resetPreviewOffset()
 
 void Project::computePreviewOffset()
 {
-    const double end = latestEnd(cadrelTracks(), projectEnd(), timeOrigin());
-    m_model.setProperty(PropertyKey::PreviewOffset, Variant(dayAfter(end)));
+    m_model.setProperty(PropertyKey::PreviewOffset, Variant(dayPastMaterial()));
+}
+
+void Project::ensurePreviewOffset()
+{
+    const bool isInUse = m_model.isPreviewActive() || !m_previewEvents->isEmpty() || m_hasLeftovers;
+    if (!hasPreviewOffset() || (!isInUse && previewOffset() < dayPastMaterial()))
+        computePreviewOffset();
+}
+
+double Project::dayPastMaterial()
+{
+    return dayAfter(latestEnd(cadrelTracks(), projectEnd(), timeOrigin()));
 }
 
 double Project::requiredOffset() const
