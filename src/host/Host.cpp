@@ -205,8 +205,8 @@ void Host::notify(const core::ChangeContext& context)
     ChangeContextNotificationBase::notify(context);
 }
 
-/// A preview that has come back has to know its tracks again, and to hold them. One that has gone would leave them locked and the user at its
-/// place, and the next would take that for the user's own.
+/// A preview that has come back has to know its tracks again, and to hold them. One that has gone would leave them locked
+/// and the user at its place, and the next would take that for the user's own.
 void Host::settleAfterUndo(Project& project)
 {
     // What an edit that failed has left there, is gone.
