@@ -92,7 +92,7 @@ std::optional<Host::Document> Host::activeDocument()
 {
     if (!m_currentProject)
         return std::nullopt;
-    return Document{m_currentProject->model(), m_currentProject->document()};
+    return Document{m_currentProject->sharedModel(), m_currentProject->document()};
 }
 
 int32 Host::projectOpened(IProjectDocument* project)
@@ -205,12 +205,16 @@ void Host::notify(const core::ChangeContext& context)
     ChangeContextNotificationBase::notify(context);
 }
 
-/// A preview that has come back has to know its tracks again. One that has gone would leave them locked and the user at its
-/// place, and the next would take that for the user's own.
+/// A preview that has come back has to know its tracks again, and to hold them. One that has gone would leave them locked
+/// and the user at its place, and the next would take that for the user's own.
 void Host::settleAfterUndo(Project& project)
 {
-    project.findLockedTracks();
+    // What an edit that failed has left there, is gone.
+    project.setLeftovers(false);
     FirstFailure failure;
+    if (project.model().isPreviewActive() && !project.hasLockTracks())
+        failure.ofStep([&] { lockAgain(project); });
+    project.findLockedTracks();
     // A preview that has come back needs its room, and one that has gone doesn't.
     if (!project.model().isPreviewActive() || project.hasPreviewOffset())
         failure.ofStep([&] { project.extendProjectEnd(false); });
@@ -222,6 +226,16 @@ void Host::settleAfterUndo(Project& project)
     failure.ofStep([&] { project.setTracksLocked(false); });
     project.releaseLockTracks();
     failure.raise();
+}
+
+void Host::lockAgain(Project& project)
+{
+    core::Variant isAtDestination(false);
+    project.model().getProperty(core::PropertyKey::PreviewAtDestination, isAtDestination);
+    if (project.previewEvents().isEmpty() || !isAtDestination.toBool())
+        return;
+    project.collectLockTracks();
+    project.setTracksLocked(true);
 }
 
 int32 Host::projectEdited(IProjectDocument* project, IEditTransaction* transaction)

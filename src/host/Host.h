@@ -168,6 +168,8 @@ private:
     Project* find(Velmark::IProjectDocument* document) const;
     void setCurrentProject(Project* project);
     void settleAfterUndo(Project& project);
+    /// The tracks of a preview that a redo has brought back, where its new place is looked at.
+    static void lockAgain(Project& project);
     static void showAlert(const std::wstring& message);
 
     // Runs and previews, in HostRuns.cpp.
@@ -193,7 +195,6 @@ private:
     void joinPieces(double start, double end);
     /// Makes sure that there is a preview offset, and throws what keeps a run from beginning.
     void prepareStart();
-    static void ensurePreviewOffset(Project& project);
     /// The one that is open.
     Velmark::IEditTransaction& openTransaction() const;
     void announce(const wchar_t* text);

@@ -128,14 +128,8 @@ Result::Type Host::startPreview(const core::EventList& events, std::uint64_t fir
 void Host::prepareStart()
 {
     if (m_currentProject)
-        ensurePreviewOffset(*m_currentProject);
+        m_currentProject->ensurePreviewOffset();
     requireSuccess(canStart());
-}
-
-void Host::ensurePreviewOffset(Project& project)
-{
-    if (!project.hasPreviewOffset())
-        project.computePreviewOffset();
 }
 
 Result::Type Host::canStart()
@@ -182,6 +176,7 @@ Result::Type Host::runCadrel()
         });
         requireSuccess(result);
         if (actions) {
+            project.setLeftovers(true);
             takeBack(*actions);
             throw Result::Cancelled;
         }
@@ -239,7 +234,7 @@ Result::Type Host::withProgress(const Appearance& appearance, std::size_t eventC
     bool isBlocked = false;
     const Result::Type result = resultOf([&] {
         project.setUseTrackCache(true);
-        ensurePreviewOffset(project);
+        project.ensurePreviewOffset();
         m_transport.stop();
         m_progress = &progress;
         project.setProgress(&progress);
@@ -272,7 +267,8 @@ Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTra
     if (m_transaction) {
         const Result::Type kept = resultOf([&] {
             if (previewed.events() != previewedBefore)
-                requireOk(m_transaction->addStep(makeCounted<PreviewEventsStep>(previewed, previewedBefore).get()));
+                requireOk(m_transaction->addStep(
+                    makeCounted<PreviewEventsStep>(m_currentProject->sharedPreviewEvents(), previewedBefore).get()));
         });
         // Otherwise a memo might be carried over to the wrong place.
         if (kept != Result::Ok)
@@ -286,6 +282,7 @@ Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTra
         m_transaction.reset();
     }
     m_processing = false;
+    m_currentProject->setLeftovers(result != Result::Ok);
     return result;
 }
 
@@ -340,16 +337,17 @@ void Host::setPreviewActive(bool active)
     }
     if (!wasActive && active)
         m_restorePreviewState = true;
+    // Once the preview is on, its place doesn't change.
+    if (active)
+        failure.ofStep([&] { project.ensurePreviewOffset(); });
     model.setPreviewActive(active);
     failure.ofStep([&] { model.notifyPreviewState(); });
     if (!active) {
         failure.ofStep([&] { project.setTracksLocked(false); });
         project.releaseLockTracks();
-    } else {
+    } else if (!wasActive) {
         // The stored cycle is the one from before the preview moved it.
-        if (!wasActive)
-            failure.ofStep([&] { keepCycles(); });
-        failure.ofStep([&] { ensurePreviewOffset(project); });
+        failure.ofStep([&] { keepCycles(); });
     }
     failure.ofStep([&] { project.extendProjectEnd(active); });
     tellDropped(dropped);

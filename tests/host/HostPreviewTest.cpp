@@ -4,6 +4,7 @@
 
 #include "core/notify/ChangeContext.h"
 #include "host/Host.h"
+#include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
 #include "host/undo/PreviewEventsStep.h"
@@ -19,6 +20,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <initializer_list>
 #include <memory>
@@ -217,6 +220,81 @@ TEST_P(HostPreviewTest, IsTakenBackWholeByAnUndo)
     ASSERT_TRUE(host.redo());
     EXPECT_TRUE(adapter().isPreviewActive());
     EXPECT_EQ(host.contentOf(track), after);
+}
+
+TEST_P(HostPreviewTest, LocksTheTracksAgainWhenItIsRedone)
+{
+    const Node own = host.addTrack(TypeWord::Audio, u"Own");
+    query<ITrackNode>(own)->setFlag(TrackFlag::Lock, true);
+    host.settings().setCreateOverlapMarkers(true);
+    previewAll();
+    ASSERT_TRUE(host.undo());
+    ASSERT_FALSE(isLocked(track));
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_TRUE(isLocked(track));
+    EXPECT_TRUE(isLocked(host.trackNamed(u"Overlap")));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Memos")));
+
+    adapter().setPreviewActive(false);
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Overlap")));
+    EXPECT_TRUE(isLocked(own)) << "That is the user's lock.";
+}
+
+TEST_P(HostPreviewTest, LeavesTheTracksFreeWhenItIsRedoneWhereTheOldPlaceWasLookedAt)
+{
+    adapter().setPreviewActive(true);
+    host.preview(changes(), 0, 0, false);
+    ASSERT_TRUE(host.undo());
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+    EXPECT_FALSE(isLocked(track));
+}
+
+TEST_P(HostPreviewTest, LocksTheTracksAgainWhenItsEndIsUndone)
+{
+    host.settings().setCreateOverlapMarkers(true);
+    previewAll();
+    adapter().setPreviewActive(false);
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_TRUE(isLocked(track));
+    EXPECT_TRUE(isLocked(host.trackNamed(u"Overlap")));
+
+    ASSERT_TRUE(host.redo());
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_FALSE(isLocked(host.trackNamed(u"Overlap")));
+}
+
+TEST_P(HostPreviewTest, LeavesItsTracksFreeOfWhichARunWasRedone)
+{
+    previewAll();
+    host.conform();
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(host.redo());
+    ASSERT_TRUE(isLocked(track));
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_FALSE(isLocked(track));
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostPreviewTest, HasUndoStepsThatOutliveTheAdapter)
+{
+    previewAll();
+    host.disconnect();
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
 }
 
 TEST_P(HostPreviewTest, LeadsTheUserBackWhenItIsUndone)
@@ -919,6 +997,63 @@ TEST_P(HostPreviewTest, LeavesNoTrackLockedThatNothingCouldUnlock)
     EXPECT_FALSE(isLocked(track));
 }
 
+TEST_P(HostPreviewTest, MovesFurtherAwayWhereMaterialHasComeToReachItsPlace)
+{
+    constexpr double Place = Day - 3600.0;
+    for (const auto& [end, place] :
+         {Span(Place - 1.0 / 384000.0, Day), Span(Place, 2.0 * Day), Span(Place + 1.0 / 384000.0, 2.0 * Day)}) {
+        SCOPED_TRACE(end - Place);
+        host.addSound(track, u"late", Place - 10.0, end);
+        host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(Day));
+
+        adapter().setPreviewActive(true);
+        EXPECT_EQ(adapter().getRunState().previewOffset, place);
+        adapter().setPreviewActive(false);
+
+        host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(Day));
+        ASSERT_EQ(adapter().startCadrel(), Result::Ok);
+        EXPECT_EQ(adapter().getRunState().previewOffset, place);
+        adapter().endPreview();
+    }
+}
+
+TEST_P(HostPreviewTest, LeavesMaterialWholeThatHasComeToReachItsPlace)
+{
+    host.conform();
+    const Texts conformed{"two 0-10", "one 10-20", "late 82790-82830"};
+    host.addSound(track, u"late", 82790.0, 82830.0);
+
+    previewAll();
+    EXPECT_EQ(host.contentOf(track),
+              (Texts{"two 0-10", "one 10-20", "late 82790-82830", "one 172800-172810", "two 172810-172820"}));
+
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(track), conformed);
+}
+
+TEST_P(HostPreviewTest, MovesFurtherAwayWhereTheTimeOriginHasMoved)
+{
+    host.conform();
+    host.project.setTimeOrigin(host.origin + Day);
+
+    adapter().setPreviewActive(true);
+    EXPECT_EQ(adapter().getRunState().previewOffset, 2.0 * Day);
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostPreviewTest, StaysWhereItIsAsLongAsItIsOn)
+{
+    previewAll();
+    host.addSound(track, u"late", Day, Day + 40.0);
+
+    host.preview(secondChange());
+
+    EXPECT_EQ(adapter().getRunState().previewOffset, Day);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410"}));
+}
+
 // Memos.
 
 TEST_P(HostMemoTest, FollowWhatTheUserDoesToTheirCopies)
@@ -1000,6 +1135,62 @@ TEST_P(HostMemoTest, FollowThePreviewThatAnUndoBroughtBack)
     edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
 
     EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 7-7", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, FollowThePreviewThatWasOnWhenTheProjectWasSaved)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+    host.project.announceStoring();
+    host.disconnect();
+    host.connect();
+
+    edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
+
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 7-7", "far 30-30"}));
+    EXPECT_TRUE(host.alerts->messages.empty());
+}
+
+TEST_P(HostMemoTest, StayWhereTheStoredEventsOfThePreviewAreDamaged)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+    host.project.announceStoring();
+    FVariant stored;
+    requireOk(host.root()->getAttribute(AttributeKey::Storage, stored));
+    const auto list = query<IAttributeData>(stored.asObject());
+    std::vector<std::uint8_t> bytes(static_cast<std::size_t>(list->getBinarySize("CaDrPreview")));
+    ASSERT_GT(bytes.size(), 8U);
+    requireOk(list->getBinary("CaDrPreview", bytes.data(), static_cast<int32>(bytes.size())));
+    const auto reopenWith = [&](const std::vector<std::uint8_t>& damaged) {
+        requireOk(list->setBinary("CaDrPreview", damaged.data(), static_cast<int32>(damaged.size()), true));
+        requireOk(host.root()->setAttribute(AttributeKey::Storage, stored, true));
+        host.disconnect();
+        requireOk(host.root()->setAttribute(AttributeKey::Storage, stored, true));
+        host.connect();
+    };
+
+    for (std::size_t size = 0; size < bytes.size(); ++size) {
+        SCOPED_TRACE(size);
+        reopenWith({bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(size)});
+        ASSERT_TRUE(adapter().isPreviewActive());
+    }
+    for (std::size_t at = 0; at < bytes.size(); ++at) {
+        SCOPED_TRACE(at);
+        std::vector<std::uint8_t> damaged = bytes;
+        damaged[at] ^= 0x80;
+        reopenWith(damaged);
+        ASSERT_TRUE(adapter().isPreviewActive());
+    }
+    edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "far 30-30"}));
+    EXPECT_TRUE(host.alerts->messages.empty());
+
+    reopenWith(bytes);
+    edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(18.0)); });
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 8-8", "far 30-30"}));
 }
 
 TEST_P(HostMemoTest, StayWhenThePreviewIsUndone)

@@ -164,8 +164,19 @@ void Project::resetPreviewOffset()
 
 void Project::computePreviewOffset()
 {
-    const double end = latestEnd(cadrelTracks(), projectEnd(), timeOrigin());
-    m_model.setProperty(PropertyKey::PreviewOffset, Variant(dayAfter(end)));
+    m_model.setProperty(PropertyKey::PreviewOffset, Variant(dayPastMaterial()));
+}
+
+void Project::ensurePreviewOffset()
+{
+    const bool isInUse = m_model.isPreviewActive() || !m_previewEvents->isEmpty() || m_hasLeftovers;
+    if (!hasPreviewOffset() || (!isInUse && previewOffset() < dayPastMaterial()))
+        computePreviewOffset();
+}
+
+double Project::dayPastMaterial()
+{
+    return dayAfter(latestEnd(cadrelTracks(), projectEnd(), timeOrigin()));
 }
 
 double Project::requiredOffset() const
@@ -252,7 +263,7 @@ void Project::onProjectEdited(IEditTransaction& transaction)
 
 MemoSync::Previewed Project::previewed() const
 {
-    return {m_previewEvents.events(), getFramerate(), requiredOffset()};
+    return {m_previewEvents->events(), getFramerate(), requiredOffset()};
 }
 
 void Project::syncMemos(IEditTransaction& transaction)

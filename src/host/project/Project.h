@@ -31,6 +31,7 @@
 #include <vector>
 
 namespace Velmark {
+class IAttributeData;
 class IHostContext;
 class IParameter;
 } // namespace Velmark
@@ -72,11 +73,14 @@ public:
     Velmark::IProjectDocument* document() const { return m_document; }
     Velmark::IHostContext* hostContext() const override { return m_hostContext; }
     core::DataModel& model() { return m_model; }
+    /// For those who may outlive the project, and hold it weakly.
+    const std::shared_ptr<core::DataModel>& sharedModel() const { return m_sharedModel; }
     MediaPool& mediaPool() { return m_mediaPool; }
 
     // Storage, as attributes of the host's project; in ProjectStorage.cpp.
 
-    /// Finds the tracks that are held locked and reads the stored model, if there is one, into the fresh project. When no
+    /// Finds the tracks that are held locked and reads the stored model, if there is one, into the fresh project, and which
+    /// events are previewed. If that can't be read, no memo follows its copy until the next preview. When no
     /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
     /// model is empty then.
     void load();
@@ -113,6 +117,11 @@ public:
     /// Stores the first whole day past every event in the project as the offset; automation points further on don't
     /// count.
     void computePreviewOffset();
+    /// Does so where there is none, or where the one there has become too small: the time origin has moved, or material
+    /// has come to reach it. While the preview stretch holds what the system has written, the offset stays.
+    void ensurePreviewOffset();
+    /// Whether an edit that has failed may have left something in the preview stretch.
+    void setLeftovers(bool flag) { m_hasLeftovers = flag; }
     void getLocators(double& left, double& right) const;
     /// With `adjust` both move down by a tenth of their distance and lose the time origin; without they go to the host as
     /// they are.
@@ -165,7 +174,9 @@ public:
     void extendProjectEnd(bool active);
     core::CadrelRunState runState();
     core::CadrelPreviewState previewState();
-    core::EventList& previewEvents() { return m_previewEvents; }
+    core::EventList& previewEvents() { return *m_previewEvents; }
+    /// As with the model.
+    const std::shared_ptr<core::EventList>& sharedPreviewEvents() const { return m_previewEvents; }
     /// Not owned; null outside of a run.
     void setProgress(core::ProgressHandlerBase* progress) { m_progress = progress; }
 
@@ -180,12 +191,16 @@ public:
 
 private:
     void readModel();
+    void readPreviewEvents(Velmark::IAttributeData& list);
+    void writePreviewEvents(Velmark::IAttributeData& list) const;
     core::Framerate readFramerate() const;
     void updateFramerate();
     /// The seconds of a day of the clock under the project's rate.
     double dayLength() const;
     /// The start of the first whole day past a time.
     double dayAfter(double seconds) const;
+    /// The first whole day past every event in the project.
+    double dayPastMaterial();
     /// Throws Result::NotAvailable without one.
     double requiredOffset() const;
     /// The latest end of an event of these tracks that starts before a time, `earliest` at the least.
@@ -236,13 +251,15 @@ private:
     Track m_folderTrack;
     /// Nothing while it isn't in use, and until it's filled.
     std::optional<std::vector<Velmark::Counted<Velmark::ITrackNode>>> m_trackCache;
-    core::DataModel m_model;
+    const std::shared_ptr<core::DataModel> m_sharedModel = std::make_shared<core::DataModel>();
+    core::DataModel& m_model = *m_sharedModel;
     Velmark::IHostContext* m_hostContext;
     mutable core::Framerate m_framerate; ///< unknown until it's read
-    core::EventList m_previewEvents{core::ListKind::Change};
+    const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;
+    bool m_hasLeftovers = false;
     TrackIndexes m_indexes; ///< cleared by each edit
     MemoSync m_memoSync;
 };

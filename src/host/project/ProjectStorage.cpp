@@ -12,6 +12,7 @@
 
 #include <cstdint>
 #include <limits>
+#include <string>
 #include <vector>
 
 using namespace Velmark;
@@ -23,24 +24,39 @@ namespace cadrel::host {
 // What is stored with the host's project:
 //
 //     "CaDr"   list of binary values
-//                  "CaDrData"   the model
+//                  "CaDrData"      the model
+//                  "CaDrPreview"   while a preview is on: the CRC-32 of the previewed events, and as a text their bytes
 //     "CaDs"   the CRC-32 of those bytes
 
 namespace {
 
-ByteArchive readBlock(IProjectNode& project)
+/// In the same list, so that both are replaced at one go.
+constexpr const char* StoragePreview = "CaDrPreview";
+
+Counted<IAttributeData> readList(IProjectNode& project)
 {
     FVariant list;
     requireOk(project.getAttribute(AttributeKey::Storage, list));
-    const auto data = required(query<IAttributeData>(list.asObject()));
-    const int32 size = data->getBinarySize(AttributeKey::StorageData);
+    return required(query<IAttributeData>(list.asObject()));
+}
+
+ByteArchive readBlock(IAttributeData& list, const char* key)
+{
+    const int32 size = list.getBinarySize(key);
     if (size < 0)
         throw Result::HostCallFailed;
     std::vector<std::uint8_t> bytes(static_cast<std::size_t>(size));
-    requireOk(data->getBinary(AttributeKey::StorageData, bytes.data(), size));
+    requireOk(list.getBinary(key, bytes.data(), size));
     ByteArchive block;
     block.assign(bytes.data(), bytes.size());
     return block;
+}
+
+void writeBlock(IAttributeData& list, const char* key, const ByteArchive& block)
+{
+    if (block.size() > static_cast<std::size_t>(std::numeric_limits<int32>::max()))
+        throw Result::OutOfRange;
+    requireOk(list.setBinary(key, block.data(), static_cast<int32>(block.size()), true));
 }
 
 std::uint32_t readChecksum(IProjectNode& project)
@@ -72,13 +88,42 @@ void Project::readModel()
     const auto project = root();
     if (project->hasAttribute(AttributeKey::Storage) != ResultOk)
         return;
-    ByteArchive block = readBlock(*project);
+    const auto list = readList(*project);
+    ByteArchive block = readBlock(*list, AttributeKey::StorageData);
     if (readChecksum(*project) != block.crc32())
         throw Result::ChecksumMismatch;
 
     // The timecodes in the block are those of this project.
     const FramerateScope ownRate(*this);
     block >> m_model;
+    if (isPreviewing() && resultOf([&] { readPreviewEvents(*list); }) != Result::Ok)
+        m_previewEvents->clear();
+}
+
+void Project::readPreviewEvents(IAttributeData& list)
+{
+    ByteArchive stored = readBlock(list, StoragePreview);
+    std::uint32_t checksum = 0;
+    std::string bytes;
+    stored >> checksum >> bytes;
+    ByteArchive events;
+    events.assign(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
+    if (events.crc32() != checksum)
+        throw Result::ChecksumMismatch;
+    events >> *m_previewEvents;
+    findTrack(markerTrack(TrackRole::Memos), TypeWord::Marker, TrackRole::Memos);
+    rememberMemos();
+}
+
+void Project::writePreviewEvents(IAttributeData& list) const
+{
+    if (!isPreviewing() || m_previewEvents->isEmpty())
+        return;
+    ByteArchive events;
+    events << *m_previewEvents;
+    ByteArchive stored;
+    stored << events.crc32() << std::string(events.data(), events.data() + events.size());
+    writeBlock(list, StoragePreview, stored);
 }
 
 void Project::save()
@@ -89,10 +134,9 @@ void Project::save()
 
     ByteArchive block;
     block << m_model;
-    if (block.size() > static_cast<std::size_t>(std::numeric_limits<int32>::max()))
-        throw Result::OutOfRange;
     const auto list = required(create<IAttributeData>(m_hostContext));
-    requireOk(list->setBinary(AttributeKey::StorageData, block.data(), static_cast<int32>(block.size()), true));
+    writeBlock(*list, AttributeKey::StorageData, block);
+    writePreviewEvents(*list);
     requireOk(project->setAttribute(AttributeKey::Storage, FVariant::object(list.get()), true));
     const int32 result = project->setAttribute(AttributeKey::StorageChecksum, FVariant::integer(block.crc32()), true);
     // A block without a checksum would count as damaged.

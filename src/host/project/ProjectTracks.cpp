@@ -66,6 +66,8 @@ void Project::setTracksLocked(bool lock)
 void Project::collectLockTracks()
 {
     m_lockedTracks.clear();
+    for (std::int32_t role = TrackRole::Destination; role <= TrackRole::LastMarker; ++role)
+        findTrack(markerTrack(role), TypeWord::Marker, role);
     const Track video = newVideoTrack();
     for (const Track& track : cadrelTracks()) {
         const bool isOwn = isMarkerTrack(track) || track == video;

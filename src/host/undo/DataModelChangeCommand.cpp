@@ -13,23 +13,25 @@ using core::serialize::ByteArchive;
 using Velmark::IEditTransaction;
 using Velmark::IProjectDocument;
 
-DataModelChangeCommand::DataModelChangeCommand(std::wstring name, IEditTransaction& transaction, core::DataModel& model,
-                                               IProjectDocument* project)
-    : DataModelChangeCommand(std::move(name), transaction, model, project, DataModelEditStep::snapshotOf(model), true)
+DataModelChangeCommand::DataModelChangeCommand(std::wstring name, IEditTransaction& transaction,
+                                               const std::shared_ptr<core::DataModel>& model, IProjectDocument* project)
+    : DataModelChangeCommand(std::move(name), transaction, model, project, DataModelEditStep::snapshotOf(*model), true)
 {
 }
 
-DataModelChangeCommand::DataModelChangeCommand(IEditTransaction& transaction, core::DataModel& model,
-                                               IProjectDocument* project, ByteArchive before)
+DataModelChangeCommand::DataModelChangeCommand(IEditTransaction& transaction,
+                                               const std::shared_ptr<core::DataModel>& model, IProjectDocument* project,
+                                               ByteArchive before)
     : DataModelChangeCommand({}, transaction, model, project, std::move(before), false)
 {
 }
 
-DataModelChangeCommand::DataModelChangeCommand(std::wstring name, IEditTransaction& transaction, core::DataModel& model,
-                                               IProjectDocument* project, ByteArchive before, bool commitOnEnd)
+DataModelChangeCommand::DataModelChangeCommand(std::wstring name, IEditTransaction& transaction,
+                                               const std::shared_ptr<core::DataModel>& model, IProjectDocument* project,
+                                               ByteArchive before, bool commitOnEnd)
     : core::DataModelChangeCommand(std::move(name)),
-      m_transaction(Velmark::Counted<IEditTransaction>::share(&transaction)), m_model(&model), m_project(project),
-      m_step(Velmark::makeCounted<DataModelEditStep>(*m_model, std::move(before))), m_commitOnEnd(commitOnEnd)
+      m_transaction(Velmark::Counted<IEditTransaction>::share(&transaction)), m_project(project),
+      m_step(Velmark::makeCounted<DataModelEditStep>(model, std::move(before))), m_commitOnEnd(commitOnEnd)
 {
     // This comes after everything else that can fail, so that no transaction is left open.
     if (m_commitOnEnd)

@@ -7,6 +7,7 @@
 #include "velmark/Counted.h"
 #include "velmark/Editing.h"
 
+#include <memory>
 #include <string>
 
 namespace Velmark {
@@ -22,20 +23,20 @@ class DataModelChangeCommand : public core::DataModelChangeCommand {
 public:
     /// A change that is an entry of the undo list by itself: begins the transaction, and commits it under the name at the
     /// end. Throws Result::HostCallFailed when it can't begin; nothing is committed then.
-    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction, core::DataModel& model,
-                           Velmark::IProjectDocument* project);
+    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction,
+                           const std::shared_ptr<core::DataModel>& model, Velmark::IProjectDocument* project);
     /// A change within an open transaction, whose commit is somebody else's. `before` is the snapshot to go back to.
-    DataModelChangeCommand(Velmark::IEditTransaction& transaction, core::DataModel& model,
+    DataModelChangeCommand(Velmark::IEditTransaction& transaction, const std::shared_ptr<core::DataModel>& model,
                            Velmark::IProjectDocument* project, core::serialize::ByteArchive before);
     ~DataModelChangeCommand() override;
 
 private:
     /// The other constructors call this one.
-    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction, core::DataModel& model,
-                           Velmark::IProjectDocument* project, core::serialize::ByteArchive before, bool commitOnEnd);
+    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction,
+                           const std::shared_ptr<core::DataModel>& model, Velmark::IProjectDocument* project,
+                           core::serialize::ByteArchive before, bool commitOnEnd);
 
     Velmark::Counted<Velmark::IEditTransaction> m_transaction;
-    core::DataModel* m_model;
     Velmark::IProjectDocument* m_project;
     Velmark::Counted<DataModelEditStep> m_step;
     bool m_commitOnEnd;

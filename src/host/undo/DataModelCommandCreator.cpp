@@ -26,7 +26,7 @@ Command DataModelCommandCreator::createCommand(const std::wstring& name)
 Command DataModelCommandCreator::createCommand(EditTransactionHandle& transaction)
 {
     const std::optional<Document> document = activeDocument();
-    return document ? createCommand(transaction, DataModelEditStep::snapshotOf(document->model)) : nullptr;
+    return document ? createCommand(transaction, DataModelEditStep::snapshotOf(*document->model)) : nullptr;
 }
 
 Command DataModelCommandCreator::createCommand(EditTransactionHandle& transaction, const ByteArchive& snapshot)

@@ -4,6 +4,7 @@
 
 #include "core/model/DataModelCommandCreator.h"
 
+#include <memory>
 #include <optional>
 
 namespace Velmark {
@@ -46,7 +47,7 @@ public:
 protected:
     /// A model and the host's project that it belongs to.
     struct Document {
-        core::DataModel& model;
+        std::shared_ptr<core::DataModel> model;
         Velmark::IProjectDocument* project;
     };
 

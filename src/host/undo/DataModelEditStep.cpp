@@ -19,8 +19,8 @@ ByteArchive DataModelEditStep::snapshotOf(const core::DataModel& model)
     return snapshot;
 }
 
-DataModelEditStep::DataModelEditStep(core::DataModel& model, ByteArchive before)
-    : m_snapshot(std::move(before)), m_model(&model)
+DataModelEditStep::DataModelEditStep(std::weak_ptr<core::DataModel> model, ByteArchive before)
+    : m_snapshot(std::move(before)), m_model(std::move(model))
 {
     m_snapshot.rewind();
 }
@@ -28,9 +28,12 @@ DataModelEditStep::DataModelEditStep(core::DataModel& model, ByteArchive before)
 Result::Type DataModelEditStep::swap()
 {
     return resultOf([this] {
+        const auto model = m_model.lock();
+        if (!model)
+            throw Result::NotAvailable;
         // Kept before the restore, which empties the model when it fails.
-        ByteArchive other = std::exchange(m_snapshot, snapshotOf(*m_model));
-        m_model->restore(other);
+        ByteArchive other = std::exchange(m_snapshot, snapshotOf(*model));
+        model->restore(other);
     });
 }
 

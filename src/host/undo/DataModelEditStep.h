@@ -7,6 +7,8 @@
 #include "velmark/Implements.h"
 #include "velmark/Module.h"
 
+#include <memory>
+
 namespace cadrel::core {
 class DataModel;
 }
@@ -27,12 +29,13 @@ public:
     /// A snapshot of a model as it stands. Throws what the model's writing throws.
     static core::serialize::ByteArchive snapshotOf(const core::DataModel& model);
 
-    /// `before` is a snapshot from before the change. The model isn't owned: the host drops its undo list with the project.
-    DataModelEditStep(core::DataModel& model, core::serialize::ByteArchive before);
+    /// `before` is a snapshot from before the change. The step may outlive the model, and isn't part of what keeps it alive.
+    DataModelEditStep(std::weak_ptr<core::DataModel> model, core::serialize::ByteArchive before);
 
     Velmark::int32 execute() override { return Velmark::ResultOk; }
     /// Both notify the model's listeners. They answer the Result::Type of a failure; the step has changed sides even then,
     /// so that the next call brings back what stood before this one.
+    /// Without its model a step does nothing and answers Result::NotAvailable.
     Velmark::int32 undo() override { return swap(); }
     Velmark::int32 redo() override { return swap(); }
     const char16_t* getDescription() override { return nullptr; }
@@ -41,7 +44,7 @@ private:
     util::Result::Type swap();
 
     core::serialize::ByteArchive m_snapshot; ///< read from its start
-    core::DataModel* m_model;
+    std::weak_ptr<core::DataModel> m_model;
 };
 
 } // namespace cadrel::host

@@ -11,8 +11,11 @@ namespace cadrel::host {
 Velmark::int32 PreviewEventsStep::swap()
 {
     return resultOf([this] {
-        Events present = m_list.release();
-        m_list.append(std::exchange(m_other, std::move(present)));
+        const auto list = m_list.lock();
+        if (!list)
+            throw util::Result::NotAvailable;
+        Events present = list->release();
+        list->append(std::exchange(m_other, std::move(present)));
     });
 }
 

@@ -20,10 +20,14 @@ public:
 
     using Events = std::vector<std::shared_ptr<core::EventBase>>;
 
-    /// `before` is what stood in the list. The list isn't owned: the host drops its undo list with the project.
-    PreviewEventsStep(core::EventList& list, Events before) : m_list(list), m_other(std::move(before)) {}
+    /// `before` is what stood in the list. The step may outlive the list, and isn't part of what keeps it alive.
+    PreviewEventsStep(std::weak_ptr<core::EventList> list, Events before)
+        : m_list(std::move(list)), m_other(std::move(before))
+    {
+    }
 
     Velmark::int32 execute() override { return Velmark::ResultOk; }
+    /// Without their list both do nothing and answer Result::NotAvailable.
     Velmark::int32 undo() override { return swap(); }
     Velmark::int32 redo() override { return swap(); }
     const char16_t* getDescription() override { return nullptr; }
@@ -31,7 +35,7 @@ public:
 private:
     Velmark::int32 swap();
 
-    core::EventList& m_list;
+    std::weak_ptr<core::EventList> m_list;
     Events m_other; ///< what the list holds on the other side of the edit
 };
 

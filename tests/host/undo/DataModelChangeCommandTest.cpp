@@ -68,7 +68,7 @@ TEST_F(DataModelChangeCommandTest, MakesANamedChangeOneEntryOfTheUndoList)
     const Bytes before = bytes();
 
     {
-        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), model, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), shared, host.document());
         EXPECT_TRUE(isEditOpen());
         change("B");
         EXPECT_EQ(undoNames(), Names{});
@@ -88,7 +88,7 @@ TEST_F(DataModelChangeCommandTest, MakesAnEntryWithoutAChangeToo)
     const Bytes before = bytes();
 
     {
-        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), model, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), shared, host.document());
     }
 
     EXPECT_EQ(undoNames(), Names{u"Load New EDL"});
@@ -104,7 +104,7 @@ TEST_F(DataModelChangeCommandTest, LeavesTheNameOfAnOpenEditToItsCommit)
     host.addTrack(TypeWord::Marker, u"Overlap");
 
     {
-        const DataModelChangeCommand command(*host.transaction(), model, host.document(),
+        const DataModelChangeCommand command(*host.transaction(), shared, host.document(),
                                              DataModelEditStep::snapshotOf(model));
         change("B");
     }
@@ -130,7 +130,7 @@ TEST_F(DataModelChangeCommandTest, GoesBackToTheSnapshotThatItWasGiven)
     change("B");
 
     host.edit(u"Preview", [&] {
-        const DataModelChangeCommand command(*host.transaction(), model, host.document(), snapshot);
+        const DataModelChangeCommand command(*host.transaction(), shared, host.document(), snapshot);
         change("C");
     });
 
@@ -142,7 +142,7 @@ TEST_F(DataModelChangeCommandTest, KeepsWhatWasChangedBeforeAFailureAsItsEntry)
 {
     const Bytes before = bytes();
     const auto failingChange = [&] {
-        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), model, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), shared, host.document());
         change("B");
         throw Result::OutOfRange;
     };
@@ -160,7 +160,7 @@ TEST_F(DataModelChangeCommandTest, LeavesAnEditAloneThatIsOpenAlready)
 {
     host.transaction()->begin(true);
 
-    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", *host.transaction(), model, host.document()); }),
+    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", *host.transaction(), shared, host.document()); }),
               Result::HostCallFailed);
 
     EXPECT_TRUE(isEditOpen());
@@ -172,7 +172,7 @@ TEST_F(DataModelChangeCommandTest, IsntMadeOfAModelThatCantBeStored)
 {
     model.changeEdl().add(std::make_shared<UnwritableEvent>());
 
-    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", *host.transaction(), model, host.document()); }),
+    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", *host.transaction(), shared, host.document()); }),
               Result::OutOfRange);
 
     EXPECT_FALSE(isEditOpen());
@@ -184,7 +184,7 @@ TEST_F(DataModelChangeCommandTest, AddsItsStepAndCommitsUnderTheNameInUtf16)
     const auto transaction = makeCounted<RecordingTransaction>();
 
     {
-        const DataModelChangeCommand command(L"Z\u00fcrich \U0001F3AC", *transaction, model, host.document());
+        const DataModelChangeCommand command(L"Z\u00fcrich \U0001F3AC", *transaction, shared, host.document());
         EXPECT_EQ(transaction->calls, std::vector<std::string>{"begin true"});
         EXPECT_EQ(transaction->refCount(), 2);
     }
@@ -201,7 +201,7 @@ TEST_F(DataModelChangeCommandTest, AddsNothingButItsStepToAnOpenEdit)
     const auto transaction = makeCounted<RecordingTransaction>();
 
     {
-        const DataModelChangeCommand command(*transaction, model, host.document(),
+        const DataModelChangeCommand command(*transaction, shared, host.document(),
                                              DataModelEditStep::snapshotOf(model));
     }
 
@@ -214,7 +214,7 @@ TEST_F(DataModelChangeCommandTest, PassesOverWhatTheHostRefusesAtTheEnd)
     const auto transaction = makeCounted<RecordingTransaction>();
 
     {
-        const DataModelChangeCommand command(L"Load New EDL", *transaction, model, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", *transaction, shared, host.document());
         transaction->answer = ResultFalse;
     }
 
@@ -230,11 +230,11 @@ RC_GTEST_FIXTURE_PROP(DataModelChangeCommandTest, TheUndoListLeadsToEveryStateOf
     for (const bool ofModelAlone : edits) {
         const std::string roll = std::string("R").append(std::to_string(states.size()));
         if (ofModelAlone) {
-            const DataModelChangeCommand command(L"Edit", *host.transaction(), model, host.document());
+            const DataModelChangeCommand command(L"Edit", *host.transaction(), shared, host.document());
             change(roll);
         } else {
             host.edit(u"Run", [&] {
-                const DataModelChangeCommand command(*host.transaction(), model, host.document(),
+                const DataModelChangeCommand command(*host.transaction(), shared, host.document(),
                                                      DataModelEditStep::snapshotOf(model));
                 host.addTrack(TypeWord::Audio, u"Dialogue");
                 change(roll);

@@ -25,7 +25,7 @@ protected:
     /// Of a module whose active project is the test's, or none.
     class Creator : public DataModelCommandCreator {
     public:
-        Creator(core::DataModel& model, standin::tests::TestHost& host)
+        Creator(const std::shared_ptr<core::DataModel>& model, standin::tests::TestHost& host)
             : context(host.context()), m_document{model, host.document()}
         {
         }
@@ -44,7 +44,7 @@ protected:
         Document m_document;
     };
 
-    Creator creator{model, host};
+    Creator creator{shared, host};
     EditTransactionHandle transaction{*host.transaction()};
 };
 

@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <memory>
 #include <stdexcept>
 #include <utility>
 
@@ -38,7 +39,7 @@ public:
 
 TEST_F(DataModelEditStepTest, AnswersAsAStepOfTheHost)
 {
-    const auto step = makeCounted<DataModelEditStep>(model, DataModelEditStep::snapshotOf(model));
+    const auto step = makeCounted<DataModelEditStep>(shared, DataModelEditStep::snapshotOf(model));
 
     EXPECT_EQ(query<IEditStep>(step), static_cast<IEditStep*>(step.get()));
     EXPECT_TRUE(query<FObject>(step));
@@ -52,7 +53,7 @@ TEST_F(DataModelEditStepTest, AnswersAsAStepOfTheHost)
 
 TEST_F(DataModelEditStepTest, DoesNothingWhenItIsExecutedAndHasNoDescription)
 {
-    const auto step = makeCounted<DataModelEditStep>(model, DataModelEditStep::snapshotOf(model));
+    const auto step = makeCounted<DataModelEditStep>(shared, DataModelEditStep::snapshotOf(model));
     change("B");
     const Bytes after = bytes();
 
@@ -65,7 +66,7 @@ TEST_F(DataModelEditStepTest, DoesNothingWhenItIsExecutedAndHasNoDescription)
 TEST_F(DataModelEditStepTest, BringsTheModelBackByteForByteInBothDirectionsForEver)
 {
     const Bytes before = bytes();
-    const auto step = makeCounted<DataModelEditStep>(model, DataModelEditStep::snapshotOf(model));
+    const auto step = makeCounted<DataModelEditStep>(shared, DataModelEditStep::snapshotOf(model));
     change("B");
     const Bytes after = bytes();
     ASSERT_NE(before, after);
@@ -80,7 +81,7 @@ TEST_F(DataModelEditStepTest, BringsTheModelBackByteForByteInBothDirectionsForEv
 
 TEST_F(DataModelEditStepTest, TellsTheListenersOnceEachWay)
 {
-    const auto step = makeCounted<DataModelEditStep>(model, DataModelEditStep::snapshotOf(model));
+    const auto step = makeCounted<DataModelEditStep>(shared, DataModelEditStep::snapshotOf(model));
     change("B");
     notifier.heard.forget();
 
@@ -93,7 +94,7 @@ TEST_F(DataModelEditStepTest, TellsTheListenersOnceEachWay)
 
 TEST_F(DataModelEditStepTest, LeavesTheSettingsAsTheUserHasThemNow)
 {
-    const auto step = makeCounted<DataModelEditStep>(model, DataModelEditStep::snapshotOf(model));
+    const auto step = makeCounted<DataModelEditStep>(shared, DataModelEditStep::snapshotOf(model));
     change("B");
     model.settings().setHealMode(core::HealMode::Normal);
 
@@ -111,7 +112,7 @@ TEST_F(DataModelEditStepTest, ReadsASnapshotFromItsStart)
     ByteArchive snapshot = DataModelEditStep::snapshotOf(model);
     std::uint32_t version = 0;
     snapshot >> version;
-    const auto step = makeCounted<DataModelEditStep>(model, snapshot);
+    const auto step = makeCounted<DataModelEditStep>(shared, snapshot);
     change("B");
 
     EXPECT_EQ(step->undo(), ResultOk);
@@ -122,7 +123,7 @@ TEST_F(DataModelEditStepTest, ReadsASnapshotFromItsStart)
 TEST_F(DataModelEditStepTest, BringsThePresentStateBackBehindAnUndoThatFailed)
 {
     const ByteArchive whole = DataModelEditStep::snapshotOf(model);
-    const auto step = makeCounted<DataModelEditStep>(model, beginningOf(whole, whole.size() - 1));
+    const auto step = makeCounted<DataModelEditStep>(shared, beginningOf(whole, whole.size() - 1));
     change("B");
     const Bytes after = bytes();
 
@@ -137,7 +138,7 @@ TEST_F(DataModelEditStepTest, AnswersThatASnapshotIsOfANewerVersion)
 {
     ByteArchive newer;
     newer << (model.version() + 1);
-    const auto step = makeCounted<DataModelEditStep>(model, newer);
+    const auto step = makeCounted<DataModelEditStep>(shared, newer);
     change("B");
     const Bytes after = bytes();
 
@@ -150,7 +151,7 @@ TEST_F(DataModelEditStepTest, AnswersThatASnapshotIsOfANewerVersion)
 TEST_F(DataModelEditStepTest, LetsNoExceptionOfAListenerThrough)
 {
     const Bytes before = bytes();
-    const auto step = makeCounted<DataModelEditStep>(model, DataModelEditStep::snapshotOf(model));
+    const auto step = makeCounted<DataModelEditStep>(shared, DataModelEditStep::snapshotOf(model));
     change("B");
     const Bytes after = bytes();
     FailingListener failing;
@@ -164,9 +165,24 @@ TEST_F(DataModelEditStepTest, LetsNoExceptionOfAListenerThrough)
     notifier.removeListener(&failing);
 }
 
+TEST_F(DataModelEditStepTest, RefusesWhenItsModelIsGone)
+{
+    auto other = std::make_shared<DataModel>();
+    const auto step = makeCounted<DataModelEditStep>(other, DataModelEditStep::snapshotOf(*other));
+    const Bytes before = bytes();
+
+    const std::weak_ptr<DataModel> gone = other;
+    other.reset();
+    EXPECT_TRUE(gone.expired());
+
+    EXPECT_EQ(step->undo(), Result::NotAvailable);
+    EXPECT_EQ(step->redo(), Result::NotAvailable);
+    EXPECT_EQ(bytes(), before);
+}
+
 TEST_F(DataModelEditStepTest, LeavesAModelAloneThatCantBeKept)
 {
-    const auto step = makeCounted<DataModelEditStep>(model, DataModelEditStep::snapshotOf(model));
+    const auto step = makeCounted<DataModelEditStep>(shared, DataModelEditStep::snapshotOf(model));
     model.oldEdl().clear();
     model.changeEdl().add(std::make_shared<UnwritableEvent>());
 

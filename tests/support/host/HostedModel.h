@@ -77,7 +77,8 @@ protected:
     cadrel::tests::TestProject timecodes;
     standin::tests::TestHost host;
     cadrel::tests::RecordingNotifier notifier;
-    core::DataModel model;
+    std::shared_ptr<core::DataModel> shared = std::make_shared<core::DataModel>();
+    core::DataModel& model = *shared;
 };
 
 } // namespace cadrel::host::tests
