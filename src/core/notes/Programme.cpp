@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/MatchedName.h"
+#include "core/keep/Reels.h"
 #include "core/notes/EventPicture.h"
 
 #include <algorithm>
@@ -14,8 +15,6 @@
 namespace cadrel::core {
 
 namespace {
-
-constexpr std::int32_t SecondsBetweenReels = 60;
 
 /// Timecodes as frame counts.
 struct Place {
@@ -117,7 +116,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
     const std::vector<Seen> seen = seenOf(places);
     m_doubts = doubtsOf(events, rules, places, seen);
     const std::int32_t gapMaterial = numbers.numberOf("gap");
-    const std::int32_t gapBetweenReels = SecondsBetweenReels * rules.framerate.framesPerSecond;
+    const std::int32_t gapBetweenReels = partingGap(rules.framerate);
 
     const auto append = [this](ShownRun run, std::int32_t runLength) {
         run.start = length();
