@@ -88,18 +88,25 @@ std::shared_ptr<EventBase> neighbourOf(const EventList& events, const std::share
     return place == order.end() ? nullptr : place->event.lock();
 }
 
+/// Finishes also when the action throws.
+template <class Action, class Finish>
+void runAndFinish(Action action, Finish finish)
+{
+    try {
+        action();
+    } catch (...) {
+        finish();
+        throw;
+    }
+    finish();
+}
+
 } // namespace
 
 void EventList::heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode)
 {
     stopListening();
-    try {
-        healSelection(selection, referenceList, healMode);
-    } catch (...) {
-        listen();
-        throw;
-    }
-    listen();
+    runAndFinish([&] { healSelection(selection, referenceList, healMode); }, [&] { listen(); });
     notifyListeners();
 }
 
@@ -149,8 +156,10 @@ bool EventList::canHeal(const EventList& selection, const EventList& referenceLi
 
 void EventList::extendEvent(const std::shared_ptr<EventBase>& event, bool previous)
 {
-    stopListening();
-    if (const std::shared_ptr<EventBase> neighbour = neighbourOf(*this, event, previous)) {
+    const auto extend = [&] {
+        const std::shared_ptr<EventBase> neighbour = neighbourOf(*this, event, previous);
+        if (!neighbour)
+            return;
         if (previous) {
             const Timecode dstIn = neighbour->dstOut();
             const Timecode srcIn = event->srcIn() - (event->dstIn() - dstIn);
@@ -162,8 +171,9 @@ void EventList::extendEvent(const std::shared_ptr<EventBase>& event, bool previo
             event->setDstOut(dstOut);
             event->setSrcOut(srcOut);
         }
-    }
-    listen();
+    };
+    stopListening();
+    runAndFinish(extend, [&] { listen(); });
     notifyListeners();
 }
 

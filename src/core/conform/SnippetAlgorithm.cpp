@@ -6,6 +6,7 @@
 #include "core/cut/CutList.h"
 #include "core/settings/Settings.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstddef>
 
@@ -15,11 +16,17 @@ using util::Result;
 
 namespace {
 
+/// Whether a length in seconds is less than an instant.
+bool isNothing(double length)
+{
+    return length < SameInstant;
+}
+
 /// Whether a piece of a clip is short enough to be left out or taken along. Lengths in seconds.
 bool isSnippet(double length, double clipLength, const CadrelPreviewState& state)
 {
     const Settings& settings = *state.settings;
-    if (length < SameInstant)
+    if (isNothing(length))
         return false;
     const double frames = length * state.framerate.rate;
     const double threshold = settings.snippetThreshold();
@@ -32,7 +39,7 @@ bool isSnippet(double length, double clipLength, const CadrelPreviewState& state
 void adjustStart(CutEventBase& range, const CadrelPreviewState& state)
 {
     const SecondsRange clip = range.update(range.srcIn()).across;
-    if (clip.start == clip.end)
+    if (isNothing(clip.end - clip.start))
         return;
     const double outside = range.srcIn() - clip.start;
     const double inside = clip.end - range.srcIn();
@@ -49,7 +56,7 @@ void adjustStart(CutEventBase& range, const CadrelPreviewState& state)
 bool adjustEnd(CutEventBase& range, const CadrelPreviewState& state)
 {
     const SecondsRange clip = range.update(range.srcOut()).across;
-    if (clip.start == clip.end)
+    if (isNothing(clip.end - clip.start))
         return false;
     const double outside = clip.end - range.srcOut();
     const double inside = range.srcOut() - clip.start;
@@ -74,14 +81,14 @@ void makeRoom(const CutEventBase& grown, const CutList& cuts, std::size_t next, 
 {
     for (; next < cuts.size() && track < cuts.cutAt(next)->cutEvents().size(); ++next) {
         CutEventBase& follower = *cuts.cutAt(next)->cutEvents()[track];
-        if (follower.dstIn() < grown.dstIn())
+        if (!isNothing(grown.dstIn() - follower.dstIn()))
             continue;
-        const double overlap = grown.dstOut() - follower.dstIn();
-        if (!(overlap > 0.0))
+        if (isNothing(grown.dstOut() - follower.dstIn()))
             return;
-        if (!(grown.dstOut() > follower.dstOut())) {
-            follower.setDstIn(grown.dstOut());
-            follower.setSrcIn(follower.srcIn() + overlap);
+        if (isNothing(grown.dstOut() - follower.dstOut())) {
+            const double start = std::min(grown.dstOut(), follower.dstOut());
+            follower.setSrcIn(follower.srcIn() + (start - follower.dstIn()));
+            follower.setDstIn(start);
             return;
         }
         follower.setDstIn(follower.dstOut());

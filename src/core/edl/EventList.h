@@ -131,7 +131,7 @@ public:
     bool canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const;
     /// Extends an event to the end of the one before it, or to the start of the one after it, by the same length on
     /// both sides. Does nothing if there is no such neighbour. Throws Result::OutOfRange when the two overlap or the
-    /// source would leave the day, with the event unchanged.
+    /// source would leave the day, with the event unchanged; the list goes on listening.
     void extendEvent(const std::shared_ptr<EventBase>& event, bool previous);
     /// Whether there is a neighbour and a gap between the two; never throws.
     bool canExtendEvent(const std::shared_ptr<EventBase>& event, bool previous) const;

@@ -136,9 +136,15 @@ Result::Type DataModel::generateChangeEdl()
 Result::Type DataModel::generateChangeEdl(const GenerationFailureListener& onFailure)
 {
     stopListening();
-    const Result::Type result = generateAndHeal(onFailure);
-    if (result != Result::Ok)
-        m_changeEdl.clear();
+    Result::Type result = Result::Ok;
+    try {
+        result = generateAndHeal(onFailure);
+        if (result != Result::Ok)
+            m_changeEdl.clear();
+    } catch (...) {
+        startListening();
+        throw;
+    }
     startListening();
     send(EventListChangeContext(m_changeEdl.listKind()));
     return result;

@@ -82,7 +82,8 @@ public:
     void notifyPreviewState();
 
     /// Generates the change EDL from the old and the new one by the settings and heals it. A failure is returned, not
-    /// thrown, and leaves the change EDL empty. Sends one list change in any case.
+    /// thrown, and leaves the change EDL empty. Sends one list change in any case. Only an exception of a listener that
+    /// isn't a Result passes through, and sends nothing; the model goes on listening.
     util::Result::Type generateChangeEdl();
     /// Likewise, and tells `onFailure` first which events of the old and the new EDL the failure is due to. It isn't
     /// told of a failure that is due to none, such as a VFX row that doesn't compile.

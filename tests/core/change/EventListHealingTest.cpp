@@ -666,18 +666,19 @@ TEST(EventListExtend, SendsOneNotificationAndListensAgain)
     list.removeListener(&listener);
 }
 
-TEST(EventListExtend, AFailureLeavesTheListDeafToItsEvents)
+TEST(EventListExtend, AFailureLeavesTheListListeningToItsEvents)
 {
-    const Event a = stretch(0, 10);
-    const Event b = stretch(5, 10);
-    EventList list = listOf({a, b});
+    const Events events = {stretch(0, 10), stretch(5, 10)};
+    EventList list = listOf(events);
     RecordingListener listener;
     list.addListener(&listener);
 
-    EXPECT_EQ(thrownBy([&] { list.extendEvent(b, true); }), Result::OutOfRange);
-    b->setClipName("not heard");
-
+    EXPECT_EQ(thrownBy([&] { list.extendEvent(events[1], true); }), Result::OutOfRange);
     EXPECT_TRUE(listener.types.empty());
+    for (const Event& event : events)
+        event->setClipName("changed");
+
+    EXPECT_EQ(listener.types.size(), 2u);
     list.removeListener(&listener);
 }
 

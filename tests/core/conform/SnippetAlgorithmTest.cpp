@@ -746,6 +746,99 @@ TEST(SnippetAlgorithm, RangeThatStartsWithTheGrownOneGivesWayToItsEnd)
     EXPECT_EQ(film.cuts.cutAt(1)->cutEvents()[0]->srcIn(), 550.125);
 }
 
+/// A range of 50 seconds that grows by 0.125 seconds to an end, and others that follow it. Beside 0 nothing is rounded.
+struct InstantFilm : SnippetFilm {
+    explicit InstantFilm(double end) : SnippetFilm(Framerate(24, 0))
+    {
+        addClip(dialogue, 95.0, 100.125);
+        addCut({cutEvent(dialogue, {50.0, 100.0}, {end - 50.125, end - 0.125})});
+    }
+    CutEventBase& carryTo(SecondsRange destination)
+    {
+        addCut({cutEvent(dialogue, {500.0, 510.0}, destination)});
+        return *cuts.cutAt(cuts.size() - 1)->cutEvents()[0];
+    }
+};
+
+TEST(SnippetAlgorithm, NoRangeGivesWayToLessThanAnInstant)
+{
+    const auto startAfter = [](double overlap) {
+        InstantFilm film(0.0);
+        const CutEventBase& follower = film.carryTo({-overlap, 10.0});
+        film.process();
+        return follower.dstIn();
+    };
+
+    EXPECT_EQ(startAfter(1.6e-14), -1.6e-14);
+    EXPECT_EQ(startAfter(std::nextafter(SameInstant, 0.0)), -std::nextafter(SameInstant, 0.0));
+    EXPECT_EQ(startAfter(SameInstant), 0.0);
+    EXPECT_EQ(startAfter(std::nextafter(SameInstant, 1.0)), 0.0);
+}
+
+TEST(SnippetAlgorithm, RangeThatIsPassedByLessThanAnInstantGivesWayToItsEndAsTheLastOne)
+{
+    for (const double passed : {1.6e-14, std::nextafter(SameInstant, 0.0), SameInstant}) {
+        SCOPED_TRACE(passed);
+        InstantFilm film(0.0);
+        const CutEventBase& covered = film.carryTo({-0.0625, -passed});
+        const CutEventBase& next = film.carryTo({-0.03125, 10.0});
+
+        film.process();
+
+        EXPECT_EQ(covered.dstIn(), -passed);
+        EXPECT_EQ(covered.dstOut(), -passed);
+        EXPECT_EQ(next.dstIn(), passed < SameInstant ? -0.03125 : 0.0);
+    }
+}
+
+TEST(SnippetAlgorithm, RangeThatStartsLessThanAnInstantBeforeTheGrownOneStartsWithIt)
+{
+    for (const double earlier : {1.6e-14, std::nextafter(SameInstant, 0.0), SameInstant}) {
+        SCOPED_TRACE(earlier);
+        InstantFilm film(50.125);
+        const CutEventBase& follower = film.carryTo({-earlier, 60.0});
+
+        film.process();
+
+        EXPECT_EQ(follower.dstIn(), earlier < SameInstant ? 50.125 : -earlier);
+    }
+}
+
+/// Tells of one clip at any time.
+class CutEventOnClip : public CutEventBase {
+public:
+    explicit CutEventOnClip(SecondsRange clip) : m_clip(clip) {}
+    core::CutEventSpans update(double /*time*/) override
+    {
+        core::CutEventSpans spans;
+        spans.across = m_clip;
+        return spans;
+    }
+    std::wstring getTrackName() override { return L"Dialogue"; }
+    bool isAudio() override { return true; }
+
+private:
+    SecondsRange m_clip;
+};
+
+TEST(SnippetAlgorithm, ClipShorterThanAnInstantIsNone)
+{
+    for (const double length : {1.6e-14, std::nextafter(SameInstant, 0.0), SameInstant}) {
+        SCOPED_TRACE(length);
+        SnippetFilm film;
+        film.settings().setSnippetUsesPercentage(false);
+        const auto range = std::make_shared<CutEventOnClip>(SecondsRange{0.0, length});
+        range->setSrcIn(0.125);
+        range->setSrcOut(-0.125);
+        film.addCut({range});
+
+        film.process();
+
+        EXPECT_EQ(range->srcIn(), length < SameInstant ? 0.125 : 0.0);
+        EXPECT_EQ(range->srcOut(), length < SameInstant ? -0.125 : length);
+    }
+}
+
 TEST(SnippetAlgorithm, WhatStandsBeforeIsToldByTheStartAsItHasBecome)
 {
     //  piece of 3 frames before the start as well: the grown range starts at 199.875

@@ -430,7 +430,7 @@ TEST_F(Model, AFailureOfTheHealingEmptiesTheChangeListAndIsTheResult)
     EXPECT_TRUE(isListening());
 }
 
-TEST_F(Model, AnyOtherExceptionLeavesTheGenerationAndTheModelDeaf)
+TEST_F(Model, AnyOtherExceptionLeavesTheGenerationAndTheModelListening)
 {
     fill();
     Saboteur saboteur;
@@ -441,13 +441,25 @@ TEST_F(Model, AnyOtherExceptionLeavesTheGenerationAndTheModelDeaf)
     EXPECT_TRUE(heard().types.empty());
     model.oldEdl().clear();
     model.newEdl().clear();
+    model.changeEdl().clear();
     model.settings().setMatchBy(1);
     model.videoList().clear();
-    EXPECT_TRUE(heard().types.empty());
-
-    model.startListening();
-    EXPECT_TRUE(isListening());
+    EXPECT_EQ(heard().types.size(), 5u);
     model.changeEdl().removeListener(&saboteur);
+}
+
+TEST_F(Model, AnExceptionOfWhoIsToldOfAFailureLeavesTheModelListening)
+{
+    fill();
+    const auto endless = makeEvent("A", "00:10:00:00", "00:10:10:00", "01:10:00:00", "01:10:10:00");
+    endless->setTransitionType(TransitionType::Dissolve);
+    endless->setTransitionDuration(9999999);
+    model.newEdl().add(endless);
+
+    EXPECT_THROW(model.generateChangeEdl([](const GenerationFailure&) { throw std::runtime_error("out of order"); }),
+                 std::runtime_error);
+
+    EXPECT_TRUE(isListening());
 }
 
 TEST_F(Model, MarksTheVfxShotsOfTheOldAndTheNewListAlone)
