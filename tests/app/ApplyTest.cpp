@@ -649,8 +649,8 @@ TEST(Apply, AFadeAtTheEndOfTheReelIsHeardInNoInsert)
     const auto result = folder / "result.stage";
     const auto oldFile = folder.write("old.edl", oldCut());
     const auto applied = [&](const std::string& newFile) {
-        const Outcome outcome =
-            runCadrel({"apply", project, "--old", oldFile, "--new", newFile, "-o", result, "--json", "-"});
+        const Outcome outcome = runCadrel({"apply", project, "--old", oldFile, "--new", newFile, "--keep", "cut",
+                                           "--force", "-o", result, "--json", "-"});
         EXPECT_EQ(outcome.status, 0) << outcome.err;
         return json::parse(outcome.out);
     };
@@ -757,7 +757,7 @@ TEST(Apply, ASecondRunPutsItsMarkersInThePlaceOfThoseOfTheFirst)
             {"Event: 1 - A001 ", {"0-10"}}, {"Event: 2 - A002 ", {"10-18"}}, {"Event: 3 - A003 ", {"22-32"}}};
         const Places inserts{{"Insert: B009", {"18-22"}}};
         for (const Words& options : {Words{}, Words{"--tracks", "selected"}, Words{"--tracks", "all"}}) {
-            Words words{"--in-place"};
+            Words words{"--in-place", "--keep", "cut", "--force"};
             words.insert(words.end(), options.begin(), options.end());
             ASSERT_EQ(scene.apply(words).status, 0);
 
@@ -765,7 +765,7 @@ TEST(Apply, ASecondRunPutsItsMarkersInThePlaceOfThoseOfTheFirst)
             EXPECT_EQ(placesOn("Insert", scene.project), inserts);
         }
 
-        ASSERT_EQ(scene.apply({"--in-place", "--no-destination-markers"}).status, 0);
+        ASSERT_EQ(scene.apply({"--in-place", "--keep", "cut", "--force", "--no-destination-markers"}).status, 0);
         EXPECT_EQ(placesOn("Destination", scene.project), Places());
         EXPECT_EQ(placesOn("Insert", scene.project), inserts);
     }
@@ -774,10 +774,12 @@ TEST(Apply, ASecondRunPutsItsMarkersInThePlaceOfThoseOfTheFirst)
 TEST(Apply, ASecondRunReplacesMarkersInAPreservedStretchAlone)
 {
     const Scene scene;
-    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+    ASSERT_EQ(scene.apply({"--in-place", "--keep", "cut"}).status, 0);
 
     for (int time = 0; time < 2; ++time) {
-        ASSERT_EQ(scene.apply({"--in-place", "--preserve", "01:00:10:00", "01:00:20:00"}).status, 0);
+        ASSERT_EQ(
+            scene.apply({"--in-place", "--keep", "cut", "--force", "--preserve", "01:00:10:00", "01:00:20:00"}).status,
+            0);
 
         EXPECT_EQ(
             placesOn("Destination", scene.project),
@@ -790,14 +792,15 @@ TEST(Apply, ASecondRunReplacesMarkersInAPreservedStretchAlone)
 TEST(Apply, ASecondRunTellsItsOwnMarkersAlone)
 {
     const Scene scene;
-    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+    ASSERT_EQ(scene.apply({"--in-place", "--keep", "cut"}).status, 0);
 
-    const json report = scene.applyAsJson({"--force"});
+    const json report = scene.applyAsJson({"--keep", "cut", "--force"});
 
-    EXPECT_EQ(markersOf(report, "Destination"), (Words{"10-18 Event: 1 - A002 ", "22-32 Event: 2 - A003 "}));
+    EXPECT_EQ(markersOf(report, "Destination"),
+              (Words{"0-10 Event: 1 - A001 ", "10-18 Event: 2 - A002 ", "22-32 Event: 3 - A003 "}));
     EXPECT_EQ(markersOf(report, "Insert"), (Words{"18-22 Insert: B009"}));
 
-    const json ofStretch = scene.applyAsJson({"--preserve", "01:00:10:00", "01:00:20:00"});
+    const json ofStretch = scene.applyAsJson({"--keep", "cut", "--force", "--preserve", "01:00:10:00", "01:00:20:00"});
     EXPECT_EQ(markersOf(ofStretch, "Destination"), Words{"10-18 Event: 2 - A002 "});
     EXPECT_EQ(markersOf(ofStretch, "Insert"), Words{"18-20 Insert: B009"});
 }
