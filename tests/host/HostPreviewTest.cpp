@@ -509,6 +509,49 @@ TEST_P(HostPreviewTest, TakesItsRoomAlongWhenItIsUndoneAndRedone)
     EXPECT_EQ(host.project.getEnd(nullptr), end);
 }
 
+TEST_P(HostPreviewTest, LeavesTheProjectEndWhereItWasWhenTheProjectIsSavedAfterTheUndoOfItsEnd)
+{
+    const double end = host.project.getEnd(nullptr);
+    previewAll();
+    adapter().setPreviewActive(false);
+    ASSERT_TRUE(host.undo());
+    ASSERT_EQ(adapter().projectStoring(host.document()), ResultOk);
+    host.disconnect();
+    host.connect();
+    ASSERT_TRUE(adapter().isPreviewActive());
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+}
+
+TEST_P(HostPreviewTest, LeavesTheProjectEndWhereItWasWhenARunBeforeItIsUndone)
+{
+    host.conform();
+    const double end = host.project.getEnd(nullptr);
+    adapter().setPreviewActive(true);
+    ASSERT_GT(host.project.getEnd(nullptr), Day);
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_FALSE(adapter().isPreviewActive());
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+}
+
+TEST_P(HostPreviewTest, LeavesTheProjectEndWhereTheUserHasPutItSinceAnUndoHasEndedThePreview)
+{
+    host.conform();
+    adapter().setPreviewActive(true);
+    ASSERT_TRUE(host.undo());
+    const double end = host.project.getEnd(nullptr) + 100.0;
+    ASSERT_EQ(host.document()->setProjectEnd(end), ResultOk);
+
+    adapter().setPreviewActive(true);
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+}
+
 TEST_P(HostPreviewTest, LeavesALockAloneThatTheUserHasSetSince)
 {
     const auto lock = [&] { query<ITrackNode>(track)->setFlag(TrackFlag::Lock, true); };
@@ -709,7 +752,9 @@ TEST_P(HostPreviewTest, LeavesTheUsersTracksAsTheyWereWhenItEnds)
 
 TEST_P(HostPreviewTest, ComesBackWhenItsEndIsUndone)
 {
+    const double end = host.project.getEnd(nullptr);
     previewAll();
+    const double extended = host.project.getEnd(nullptr);
     const Texts during = host.contentOf(track);
     adapter().setPreviewActive(false);
 
@@ -717,10 +762,12 @@ TEST_P(HostPreviewTest, ComesBackWhenItsEndIsUndone)
     EXPECT_TRUE(adapter().isPreviewActive());
     EXPECT_TRUE(hasOffset());
     EXPECT_EQ(host.contentOf(track), during);
+    EXPECT_EQ(host.project.getEnd(nullptr), extended);
 
     ASSERT_TRUE(host.redo());
     EXPECT_FALSE(adapter().isPreviewActive());
     EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
 }
 
 TEST_P(HostPreviewTest, UnlocksTheTracksThatTheUndoOfItsEndHasLockedAgain)

@@ -384,11 +384,17 @@ TEST_P(HostRunTest, CarriesTheRestOverWhereADestinationIsReversed)
 {
     const core::Settings defaults;
     host.settings().setCreateDestinationMarkers(defaults.createDestinationMarkers());
+    host.settings().setCreateInsertMarkers(true);
     host.carryOver("01:00:00:00", "01:00:05:00", "01:00:40:00", "01:00:35:00");
+    host.model().newEdl().add(
+        cadrel::tests::makeEvent("B002", "02:00:00:00", "02:00:15:00", "01:00:30:00", "01:00:45:00", 3));
 
     host.conform();
 
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    const Texts inserts = host.contentOf(host.trackNamed(u"Insert"));
+    ASSERT_EQ(inserts.size(), 1U);
+    EXPECT_TRUE(inserts.front().ends_with(" 30-45")) << inserts.front();
     const Texts content = host.contentOf(track);
     ASSERT_GE(content.size(), 2U);
     EXPECT_EQ(content[0], "two 0-10");

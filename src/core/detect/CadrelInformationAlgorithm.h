@@ -16,6 +16,7 @@ class CutList;
 class EventBase;
 class ProgressHandlerBase;
 struct CadrelRunState;
+struct Framerate;
 
 /// Looks for one kind of spot in a conformed project. It changes nothing.
 class CadrelInformationAlgorithm {
@@ -37,8 +38,8 @@ protected:
     static void stopIfCancelled(ProgressHandlerBase* progress);
     /// The name by which events are matched: that of the clip or of the roll.
     static const std::string& nameOf(const EventBase& event, const CadrelRunState& state);
-    /// Whether the place of an event in its programme could be read and makes sense. False with one of the flaws 9 to 12.
-    static bool hasPlace(const EventBase& event);
+    /// Whether the place of an event in its programme could be read and makes sense, whatever its source.
+    static bool hasPlace(const EventBase& event, const Framerate& framerate);
     /// The cuts of CutList::orderedByStart.
     static std::vector<std::shared_ptr<Cut>> inTimeOrder(const CutList& cuts);
 };

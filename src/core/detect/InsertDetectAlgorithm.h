@@ -7,8 +7,8 @@
 namespace cadrel::core {
 
 /// Finds new picture: the stretches of the events of the new EDL that no change event covers. Passes over events whose
-/// place in the programme can't be told or is shorter than SameInstant, such as the cut half of a dissolve. Can't be
-/// cancelled.
+/// place in the programme can't be told or is shorter than SameInstant, such as the cut half of a dissolve. A change event
+/// that ends before it starts covers nothing. Can't be cancelled.
 class InsertDetectAlgorithm : public CadrelInformationAlgorithm {
 public:
     std::vector<MarkerEntry> detect(const CutList& cuts, const CadrelRunState& state,

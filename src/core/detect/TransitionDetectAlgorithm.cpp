@@ -74,7 +74,10 @@ std::vector<MarkerEntry> TransitionDetectAlgorithm::detect(const CutList& cuts, 
                                                            ProgressHandlerBase* progress) const
 {
     Transitions transitions = transitionsOf(*state.newEvents);
-    std::erase_if(transitions, [](const auto& event) { return !hasPlace(*event); });
+    std::erase_if(transitions, [&](const auto& event) {
+        return !hasPlace(*event, state.framerate) ||
+               !Timecode::isValidFrameCount(event->transitionDuration(), state.framerate);
+    });
     removeThoseAtPlacesOf(transitionsOf(*state.oldEvents), transitions);
     report(progress, 1);
 

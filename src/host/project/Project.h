@@ -211,6 +211,8 @@ private:
     bool isPreviewing() const;
     MemoSync::Previewed previewed() const;
     void restoreProjectEnd();
+    /// From the time origin; nothing where no room was made.
+    std::optional<double> endBeforePreview() const;
     void syncMemos(Velmark::IEditTransaction& transaction);
     void rememberMemos();
 
@@ -256,6 +258,9 @@ private:
     Velmark::IHostContext* m_hostContext;
     mutable core::Framerate m_framerate; ///< unknown until it's read
     const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
+    core::EventList m_previewEvents{core::ListKind::Change};
+    /// As PropertyKey::ProjectEnd, which undo steps take along with the model, though not the end itself.
+    std::optional<double> m_endBeforePreview;
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;

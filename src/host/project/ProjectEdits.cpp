@@ -21,6 +21,7 @@
 
 #include <algorithm>
 #include <map>
+#include <optional>
 #include <string>
 #include <utility>
 
@@ -361,22 +362,32 @@ void Project::extendProjectEnd(bool active)
     if (active)
         std::erase_if(tracks, [](const Track& track) { return !track.hasChanged(); });
     const double end = offset + dayAfter(latestEnd(tracks, offset, 0.0));
-    if (!(end > projectEnd()))
-        return;
-    // Without the origin, so that it comes back to the last bit.
-    const double present = root()->getEnd(nullptr);
-    requireOk(m_document->setProjectEnd(end - timeOrigin()));
-    if (!m_model.hasProperty(core::PropertyKey::ProjectEnd))
-        m_model.setProperty(core::PropertyKey::ProjectEnd, core::Variant(present));
+    if (end > projectEnd()) {
+        // Without the origin, so that it comes back to the last bit.
+        const double present = root()->getEnd(nullptr);
+        requireOk(m_document->setProjectEnd(end - timeOrigin()));
+        m_endBeforePreview = endBeforePreview().value_or(present);
+    }
+    if (m_endBeforePreview)
+        m_model.setProperty(core::PropertyKey::ProjectEnd, core::Variant(*m_endBeforePreview));
 }
 
 void Project::restoreProjectEnd()
 {
-    core::Variant end;
-    if (m_model.getProperty(core::PropertyKey::ProjectEnd, end) != Result::Ok)
+    const std::optional<double> end = endBeforePreview();
+    if (!end)
         return;
-    requireOk(m_document->setProjectEnd(std::max(end.toDouble(), 0.0)));
+    requireOk(m_document->setProjectEnd(std::max(*end, 0.0)));
     m_model.removeProperty(core::PropertyKey::ProjectEnd);
+    m_endBeforePreview.reset();
+}
+
+std::optional<double> Project::endBeforePreview() const
+{
+    core::Variant end;
+    if (m_endBeforePreview || m_model.getProperty(core::PropertyKey::ProjectEnd, end) != Result::Ok)
+        return m_endBeforePreview;
+    return end.toDouble();
 }
 
 bool Project::isWanted(const Track& track) const

@@ -525,12 +525,16 @@ TEST(CadrelerBase, EndsARunWithTheCodeThatADetectAlgorithmThrows)
 {
     SwappedFilm film;
     film.model.settings().setCreateDissolveWipeMarkers(true);
-    const auto dissolve = makeEvent("NEW", "00:00:00:00", "00:00:10:00", "10:00:00:00", "10:00:10:00");
+    const auto dissolve = makeEvent("NEW", "00:00:00:00", "00:00:10:00", "00:00:05:00", "00:00:15:00");
     dissolve->setTransitionType(core::TransitionType::Dissolve);
-    dissolve->setTransitionDuration(-1);
     film.model.newEdl().add(dissolve);
+    // The change events can't be told in seconds then.
+    film.engineWithSteps.failAt("run state", [] {
+        core::Timecode::setFramerateProvider(nullptr);
+        return Result::Ok;
+    });
 
-    EXPECT_EQ(film.engineWithSteps.run(film.model.changeEdl()), Result::OutOfRange);
+    EXPECT_EQ(film.engineWithSteps.run(film.model.changeEdl()), Result::NotAvailable);
 
     EXPECT_EQ(film.engineWithSteps.calls, stepsUpTo("run state"));
 }

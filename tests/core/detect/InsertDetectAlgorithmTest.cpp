@@ -2,7 +2,6 @@
 
 #include "core/detect/InsertDetectAlgorithm.h"
 
-#include "tests/support/ThrownResult.h"
 #include "tests/support/core/CutFilm.h"
 #include "tests/support/core/RecordingProgress.h"
 
@@ -22,7 +21,6 @@ using core::EventFlaw;
 using core::Framerate;
 using core::InsertDetectAlgorithm;
 using core::MarkerEntry;
-using util::Result;
 
 using Entries = std::vector<MarkerEntry>;
 
@@ -215,8 +213,7 @@ TEST(InsertDetectAlgorithm, NewEventShorterThanAnInstantIsNoInsertAndOneAsLongIs
 
 TEST(InsertDetectAlgorithm, NewEventWhosePlaceCannotBeToldIsPassedOver)
 {
-    for (const std::int32_t flaw : {EventFlaw::DstInUnreadable, EventFlaw::DstOutUnreadable, EventFlaw::TimecodeInvalid,
-                                    EventFlaw::TimecodeRangeInvalid}) {
+    for (const std::int32_t flaw : {EventFlaw::DstInUnreadable, EventFlaw::DstOutUnreadable}) {
         InsertFilm film;
         film.addNew("01:00:00:00", "01:00:10:00").addFlaw(flaw);
         film.addNew("01:00:20:00", "01:00:30:00");
@@ -235,6 +232,19 @@ TEST(InsertDetectAlgorithm, NewEventWithAnyOtherFlawIsAnInsert)
     }
 }
 
+TEST(InsertDetectAlgorithm, NewEventWhoseSourceAloneIsReversedOrNoTimeIsAnInsert)
+{
+    const auto insertsWithSource = [](const char* srcIn, const char* srcOut) {
+        InsertFilm film;
+        film.newEvents().add(makeEvent("A012", srcIn, srcOut, "01:00:00:00", "01:00:10:00"));
+        return film.detect();
+    };
+
+    EXPECT_EQ(insertsWithSource("10:00:01:00", "10:00:00:24"), Entries{insertOfA012(3600.0, 3610.0)});
+    EXPECT_EQ(insertsWithSource("10:00:00:00", "10:00:70:00"), Entries{insertOfA012(3600.0, 3610.0)});
+    EXPECT_EQ(insertsWithSource("10:00:00:25", "10:00:01:00"), Entries{insertOfA012(3600.0, 3610.0)});
+}
+
 TEST(InsertDetectAlgorithm, NewEventsThatEndBeforeTheyStartOrLieAtNoTimeArePassedOver)
 {
     InsertFilm film;
@@ -246,13 +256,26 @@ TEST(InsertDetectAlgorithm, NewEventsThatEndBeforeTheyStartOrLieAtNoTimeArePasse
     EXPECT_EQ(film.detect(), Entries{insertOfA012(3620.0, 3630.0)});
 }
 
-TEST(InsertDetectAlgorithm, ChangeEventThatEndsBeforeItStartsIsAnInvalidArgument)
+TEST(InsertDetectAlgorithm, ChangeEventThatEndsBeforeItStartsCoversNothing)
 {
     InsertFilm film;
     film.addNew("01:00:00:00", "01:00:30:00");
     film.carryOver("01:00:20:00", "01:00:10:00");
+    film.carryOver("01:00:05:00", "01:00:06:00");
+    film.carryOver("01:00:25:00", "01:00:24:24");
 
-    EXPECT_EQ(thrownBy([&] { film.detect(); }), Result::InvalidArgument);
+    EXPECT_EQ(film.detect(), (Entries{insertOfA012(3600.0, 3605.0), insertOfA012(3606.0, 3630.0)}));
+}
+
+TEST(InsertDetectAlgorithm, ChangeEventWhoseSourceAloneIsReversedCoversItsPlace)
+{
+    InsertFilm film;
+    film.addNew("01:00:00:00", "01:00:30:00");
+    film.carryOver("01:00:10:00", "01:00:20:00")
+        .setTimecodes(core::Timecode(1, 0, 5, 0), core::Timecode(1, 0, 0, 0), core::Timecode(1, 0, 10, 0),
+                      core::Timecode(1, 0, 20, 0));
+
+    EXPECT_EQ(film.detect(), (Entries{insertOfA012(3600.0, 3610.0), insertOfA012(3620.0, 3630.0)}));
 }
 
 TEST(InsertDetectAlgorithm, TimesAreSecondsOfTheRealRateInDropFrame)

@@ -2,7 +2,6 @@
 
 #include "core/detect/TransitionDetectAlgorithm.h"
 
-#include "tests/support/ThrownResult.h"
 #include "tests/support/core/CutFilm.h"
 #include "tests/support/core/RecordingProgress.h"
 
@@ -24,7 +23,6 @@ using core::Framerate;
 using core::MarkerEntry;
 using core::TransitionDetectAlgorithm;
 using core::TransitionType;
-using util::Result;
 
 using Entries = std::vector<MarkerEntry>;
 
@@ -213,8 +211,7 @@ TEST(TransitionDetectAlgorithm, TransitionOfNoLengthLiesInsideNothing)
 
 TEST(TransitionDetectAlgorithm, TransitionWhosePlaceCannotBeToldIsPassedOver)
 {
-    for (const std::int32_t flaw : {EventFlaw::DstInUnreadable, EventFlaw::DstOutUnreadable, EventFlaw::TimecodeInvalid,
-                                    EventFlaw::TimecodeRangeInvalid}) {
+    for (const std::int32_t flaw : {EventFlaw::DstInUnreadable, EventFlaw::DstOutUnreadable}) {
         TransitionFilm film;
         film.addNew(TransitionType::Wipe, "01:00:00:00", "01:00:10:00").addFlaw(flaw);
         film.addNew(TransitionType::Dissolve, "01:00:20:00", "01:00:30:00");
@@ -230,6 +227,19 @@ TEST(TransitionDetectAlgorithm, TransitionWithAnyOtherFlawIsMarked)
         film.addNew(TransitionType::Dissolve, "01:00:20:00", "01:00:30:00").addFlaw(flaw);
 
         EXPECT_EQ(film.detect(), (Entries{{3620.0, 3621.0, "D 7 A012", 2}})) << flaw;
+    }
+}
+
+TEST(TransitionDetectAlgorithm, TransitionWhoseSourceAloneIsReversedOrNoTimeIsMarked)
+{
+    for (const char* srcOut : {"09:59:59:24", "10:00:70:00"}) {
+        TransitionFilm film;
+        auto event = makeEvent("A012", "10:00:00:00", srcOut, "01:00:10:00", "01:00:20:00", 7);
+        event->setTransitionType(TransitionType::Dissolve);
+        event->setTransitionDuration(25);
+        film.newEvents().add(event);
+
+        EXPECT_EQ(film.detect(), (Entries{{3610.0, 3611.0, "D 7 A012", 2}})) << srcOut;
     }
 }
 
@@ -282,18 +292,32 @@ TEST(TransitionDetectAlgorithm, EventNumberIsPlainDecimal)
     EXPECT_EQ(entries[1].name, "W 4294967295 A012");
 }
 
-TEST(TransitionDetectAlgorithm, DurationThatIsNoTimecodeIsOutOfRange)
+TEST(TransitionDetectAlgorithm, TransitionWhoseDurationIsNoTimeOfTheDayIsPassedOver)
 {
-    TransitionFilm negative;
-    negative.addNew(TransitionType::Dissolve, "01:00:10:00", "01:00:20:00").setTransitionDuration(-1);
-    EXPECT_EQ(thrownBy([&] { negative.detect(); }), Result::OutOfRange);
+    const auto isMarked = [](std::int32_t duration) {
+        TransitionFilm film;
+        film.addNew(TransitionType::Dissolve, "01:00:10:00", "01:00:20:00").setTransitionDuration(duration);
+        return !film.detect().empty();
+    };
 
+    EXPECT_FALSE(isMarked(std::numeric_limits<std::int32_t>::min()));
+    EXPECT_FALSE(isMarked(-1));
+    EXPECT_TRUE(isMarked(0));
+    EXPECT_TRUE(isMarked(1));
     // A day at 25 fps has 24 x 3600 x 25 = 2160000 frames.
-    TransitionFilm wholeDay;
-    wholeDay.addNew(TransitionType::Dissolve, "01:00:10:00", "01:00:20:00").setTransitionDuration(2160000);
-    EXPECT_EQ(thrownBy([&] { wholeDay.detect(); }), Result::OutOfRange);
-    wholeDay.newEvents().at(0).setTransitionDuration(2159999);
-    EXPECT_EQ(wholeDay.detect().size(), 1U);
+    EXPECT_TRUE(isMarked(2159999));
+    EXPECT_FALSE(isMarked(2160000));
+    EXPECT_FALSE(isMarked(2160001));
+    EXPECT_FALSE(isMarked(std::numeric_limits<std::int32_t>::max()));
+}
+
+TEST(TransitionDetectAlgorithm, TransitionAfterOneWithoutAPossibleDurationIsMarked)
+{
+    TransitionFilm film;
+    film.addNew(TransitionType::Dissolve, "01:00:10:00", "01:00:20:00").setTransitionDuration(-5);
+    film.addNew(TransitionType::Wipe, "01:00:20:00", "01:00:30:00");
+
+    EXPECT_EQ(film.detect(), (Entries{{3620.0, 3621.0, "W 7 A012", 2}}));
 }
 
 TEST(TransitionDetectAlgorithm, DurationOfATransitionThatIsNotMarkedDoesNotMatter)
@@ -336,15 +360,6 @@ TEST(TransitionDetectAlgorithm, ReportsThreeStepsAndIsNotStoppedByACancel)
 
     EXPECT_EQ(entries.size(), 2U);
     EXPECT_EQ(cancelled.steps(), 3U);
-}
-
-TEST(TransitionDetectAlgorithm, ReportsAStepForEachOfItsTwoSievesBeforeItNamesMarkers)
-{
-    TransitionFilm unnameable;
-    unnameable.addNew(TransitionType::Dissolve, "01:00:10:00", "01:00:20:00").setTransitionDuration(-1);
-    RecordingProgress afterBoth;
-    EXPECT_EQ(thrownBy([&] { unnameable.detect(&afterBoth); }), Result::OutOfRange);
-    EXPECT_EQ(afterBoth.steps(), 2U);
 }
 
 TEST(TransitionDetectAlgorithm, EmptyListsGiveNoMarkersAndStillThreeSteps)
