@@ -19,7 +19,11 @@ public:
     void OnTestEnd(const testing::TestInfo&) override { m_project.reset(); }
 
 private:
-    std::optional<TestProject> m_project;
+    struct OpenProject {
+        TestProject project;
+    };
+
+    std::optional<OpenProject> m_project;
 };
 
 } // namespace

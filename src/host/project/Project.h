@@ -258,7 +258,6 @@ private:
     Velmark::IHostContext* m_hostContext;
     mutable core::Framerate m_framerate; ///< unknown until it's read
     const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
-    core::EventList m_previewEvents{core::ListKind::Change};
     /// As PropertyKey::ProjectEnd, which undo steps take along with the model, though not the end itself.
     std::optional<double> m_endBeforePreview;
     std::vector<Track> m_lockedTracks;
