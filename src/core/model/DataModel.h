@@ -40,7 +40,6 @@ struct PropertyKey {
         NewTableSelection = 10018,      ///< string, likewise
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
-        ProjectEnd = 10021,             ///< double, from the time origin, as it stood when the preview went on
     };
 };
 

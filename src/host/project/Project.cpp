@@ -47,8 +47,8 @@ bool areSame(const core::Framerate& a, const core::Framerate& b)
 } // namespace
 
 Project::Project(IHostContext* context, IProjectDocument* document)
-    : m_document(required(document)), m_mediaPool(context, document->getMediaPool()), m_hostContext(context),
-      m_memoSync(context)
+    : m_document(Counted<IProjectDocument>::share(required(document))), m_mediaPool(context, document->getMediaPool()),
+      m_hostContext(context), m_end(context, document, [this] { return contentEnd(); }), m_memoSync(context)
 {
 }
 
@@ -169,14 +169,14 @@ void Project::computePreviewOffset()
 
 void Project::ensurePreviewOffset()
 {
-    const bool isInUse = m_model.isPreviewActive() || !m_previewEvents->isEmpty() || m_hasLeftovers;
-    if (!hasPreviewOffset() || (!isInUse && previewOffset() < dayPastMaterial()))
+    if (!hasPreviewOffset() || (!hasWritten() && previewOffset() < dayPastMaterial()))
         computePreviewOffset();
 }
 
 double Project::dayPastMaterial()
 {
-    return dayAfter(latestEnd(cadrelTracks(), projectEnd(), timeOrigin()));
+    const std::vector<Track> tracks = cadrelTracks();
+    return dayAfter(std::max(latestEnd(tracks, projectEnd(), timeOrigin()), latestPoint(tracks)));
 }
 
 double Project::requiredOffset() const
@@ -270,7 +270,7 @@ void Project::syncMemos(IEditTransaction& transaction)
 {
     Track& memos = markerTrack(TrackRole::Memos);
     findTrack(memos, TypeWord::Marker, TrackRole::Memos);
-    if (!memos.hasChanged())
+    if (!memos.hasChanged() || !isWhereWritten(memos))
         return;
     memos.assignIds(0.0, requiredOffset() - timeOrigin());
     m_memoSync.follow(memos, previewed(), transaction);
@@ -279,7 +279,7 @@ void Project::syncMemos(IEditTransaction& transaction)
 void Project::rememberMemos()
 {
     const Track& memos = markerTrack(TrackRole::Memos);
-    if (isPreviewing() && memos.isAlive())
+    if (isPreviewing() && memos.isAlive() && isWhereWritten(memos))
         m_memoSync.remember(memos, previewed());
     else
         m_memoSync.forget();

@@ -9,6 +9,7 @@
 #include "core/settings/Settings.h"
 #include "core/time/SecondsRange.h"
 #include "host/border/HostFailure.h"
+#include "host/border/NodeReading.h"
 #include "host/project/Project.h"
 #include "host/track/AutomationCurve.h"
 #include "host/track/CutEvent.h"
@@ -294,8 +295,10 @@ void Project::completeApply(IEditTransaction& transaction)
     getApplyRange(start, end);
     if (isBefore(start, end))
         moveBack(transaction, tracks, start, end);
-    if (m_model.settings().restrictRange())
+    if (m_model.settings().restrictRange()) {
+        rememberWritten();
         clearPreview(transaction);
+    }
 }
 
 //     before    real |== old ==|           preview |== new ==|
@@ -319,14 +322,6 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
     deleteRange(transaction, written + offset, end + offset);
 }
 
-void Project::clearPreview(IEditTransaction& transaction)
-{
-    const double offset = requiredOffset();
-    setTracksLocked(false);
-    // Automation may reach further than the events, which alone make the end of the project.
-    deleteRange(transaction, offset, offset + std::max(offset, projectEnd()));
-}
-
 void Project::getApplyRange(double& start, double& end) const
 {
     const double offset = requiredOffset();
@@ -345,7 +340,7 @@ void Project::closeRange(bool onlySelected, double start, double end)
     const double origin = timeOrigin();
     const int32 result =
         required(service<IEditService>(m_hostContext))
-            ->closeRange(m_document, listOf(pointersTo(tracks)).get(), start - origin, end - origin, 0.0);
+            ->closeRange(m_document.get(), listOf(pointersTo(tracks)).get(), start - origin, end - origin, 0.0);
     // It is no failure if there is nothing to join.
     if (result != ResultFalse)
         requireOk(result);
@@ -354,40 +349,27 @@ void Project::closeRange(bool onlySelected, double start, double end)
 void Project::extendProjectEnd(bool active)
 {
     if (!m_model.isPreviewActive()) {
-        restoreProjectEnd();
+        m_end.putBack();
         return;
     }
     const double offset = requiredOffset();
     std::vector<Track> tracks = cadrelTracks();
     if (active)
         std::erase_if(tracks, [](const Track& track) { return !track.hasChanged(); });
-    const double end = offset + dayAfter(latestEnd(tracks, offset, 0.0));
-    if (end > projectEnd()) {
-        // Without the origin, so that it comes back to the last bit.
-        const double present = root()->getEnd(nullptr);
-        requireOk(m_document->setProjectEnd(end - timeOrigin()));
-        m_endBeforePreview = endBeforePreview().value_or(present);
+    m_end.putOffTo(offset + dayAfter(latestEnd(tracks, offset, 0.0)) - timeOrigin(), hasWritten());
+}
+
+double Project::contentEnd()
+{
+    double end = 0.0;
+    for (const auto& track : allTracks()) {
+        const auto node = required(query<IProjectNode>(track));
+        if (node->isType(TypeWord::Folder))
+            continue;
+        for (const Counted<IProjectNode>& event : childrenOf(*node))
+            end = std::max(end, event->getEnd(nullptr));
     }
-    if (m_endBeforePreview)
-        m_model.setProperty(core::PropertyKey::ProjectEnd, core::Variant(*m_endBeforePreview));
-}
-
-void Project::restoreProjectEnd()
-{
-    const std::optional<double> end = endBeforePreview();
-    if (!end)
-        return;
-    requireOk(m_document->setProjectEnd(std::max(*end, 0.0)));
-    m_model.removeProperty(core::PropertyKey::ProjectEnd);
-    m_endBeforePreview.reset();
-}
-
-std::optional<double> Project::endBeforePreview() const
-{
-    core::Variant end;
-    if (m_endBeforePreview || m_model.getProperty(core::PropertyKey::ProjectEnd, end) != Result::Ok)
-        return m_endBeforePreview;
-    return end.toDouble();
+    return end;
 }
 
 bool Project::isWanted(const Track& track) const
@@ -414,15 +396,16 @@ void Project::copyRange(const std::vector<const Track*>& tracks, double start, d
 {
     m_indexes.clear();
     const double origin = timeOrigin();
-    requireOk(required(service<IEditService>(m_hostContext))
-                  ->copyRange(m_document, listOf(tracks).get(), 0, start - origin, end - origin, destination - origin));
+    requireOk(
+        required(service<IEditService>(m_hostContext))
+            ->copyRange(m_document.get(), listOf(tracks).get(), 0, start - origin, end - origin, destination - origin));
 }
 
 void Project::deleteRange(IEditTransaction& transaction, double start, double end)
 {
     m_indexes.clear();
     const double origin = timeOrigin();
-    requireOk(transaction.deleteRange(m_document, 0, start - origin, end - origin));
+    requireOk(transaction.deleteRange(m_document.get(), 0, start - origin, end - origin));
 }
 
 void Project::tick(std::uint64_t steps)

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
 
 #include "core/cut/Cut.h"
@@ -123,6 +124,14 @@ protected:
     Result::Type complete()
     {
         return edit([](Project& project, IEditTransaction& transaction) { project.completeApply(transaction); });
+    }
+
+    /// What stands in the preview now is the system's, and what will be there.
+    void keepAsWritten()
+    {
+        for (const Track& written : host.adapter.cadrelTracks())
+            PreviewRecord::ofContent(written, Day - host.origin).keepOn(host.context(), written);
+        host.adapter.startWriting();
     }
 
     /// The track of that name in the folder of the marker tracks.
@@ -563,6 +572,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunReplacesItsRangeAlone)
     settings().setRestrictRange(true);
     settings().setPreserveMaterial(3610.0, 3620.0);
 
+    keepAsWritten();
     EXPECT_EQ(complete(), Result::Ok);
 
     EXPECT_EQ(contentOf(fx), (Content{"before 0-9", "across 9-10", "new 10-20", "behind 20-30"}));
@@ -600,6 +610,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunMayBeginBeforeTheClock)
     settings().setRestrictRange(true);
     settings().setPreserveMaterial(-100.0, 3620.0);
 
+    keepAsWritten();
     EXPECT_EQ(complete(), Result::Ok);
 
     EXPECT_EQ(contentOf(fx), (Content{"new 7-20", "behind 20-30"}));
@@ -631,6 +642,7 @@ TEST_P(ProjectEditsTest, AnEmptyRangeReplacesNothing)
     settings().setRestrictRange(true);
     settings().setPreserveMaterial(3610.0, 3610.0);
 
+    keepAsWritten();
     EXPECT_EQ(complete(), Result::Ok);
 
     EXPECT_EQ(contentOf(fx), Content{"old 5-15"});
@@ -677,13 +689,15 @@ TEST_P(ProjectEditsTest, ClearsThePreviewAndUnlocksTheTracks)
     addClip(fx, u"old", 5.0, 15.0);
     addClip(fx, u"across", Day - 3601.0, Day - 3599.0);
     addClip(fx, u"new", Day + 20.0, Day + 30.0);
+    keepAsWritten();
+    addClip(fx, u"late", Day + 25.0, Day + 35.0);
     host.adapter.collectLockTracks();
     host.adapter.setTracksLocked(true);
 
     EXPECT_EQ(edit([](Project& project, IEditTransaction& transaction) { project.clearPreview(transaction); }),
               Result::Ok);
 
-    EXPECT_EQ(contentOf(fx), (Content{"old 5-15", "across 82799-82800"}));
+    EXPECT_EQ(contentOf(fx), (Content{"old 5-15", "across 82799-82801", "preview: late 25-35"}));
     EXPECT_FALSE(host.handle(fx).hostLocked());
 }
 
@@ -697,6 +711,7 @@ TEST_P(ProjectEditsTest, ClearsTheAutomationOfThePreviewThatReachesFurtherThanAl
     host.addPoint(fx, volume, film(Day + 900.0), 0.25F);
     host.addPoint(fx, volume, film(Day + 901.0), 0.75F);
     host.addPoint(fx, volume, film(Day + 902.0), 0.25F);
+    keepAsWritten();
 
     EXPECT_EQ(edit([](Project& project, IEditTransaction& transaction) { project.clearPreview(transaction); }),
               Result::Ok);
@@ -706,13 +721,17 @@ TEST_P(ProjectEditsTest, ClearsTheAutomationOfThePreviewThatReachesFurtherThanAl
         EXPECT_EQ(curve.valueBehind(film(time)), 0.25) << time;
 }
 
-TEST_P(ProjectEditsTest, ThePreviewCannotBeClearedWithoutOffsetOrTransaction)
+TEST_P(ProjectEditsTest, ThePreviewIsClearedInATransactionAloneAndWhereverThePreviewOffsetIs)
 {
+    const auto fx = addTrack(u"FX");
+    addClip(fx, u"new", Day + 20.0, Day + 30.0);
+    keepAsWritten();
     EXPECT_EQ(thrownBy([&] { host.adapter.clearPreview(*host.transaction()); }), Result::HostCallFailed);
 
     host.adapter.resetPreviewOffset();
     EXPECT_EQ(edit([](Project& project, IEditTransaction& transaction) { project.clearPreview(transaction); }),
-              Result::NotAvailable);
+              Result::Ok);
+    EXPECT_EQ(contentOf(fx), Content());
 }
 
 TEST_P(ProjectEditsTest, ClosesARangeOnTheTracksOfTheRunInTimesOfTheHost)
