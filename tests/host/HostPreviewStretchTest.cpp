@@ -205,6 +205,31 @@ TEST_P(HostPreviewStretchTest, StandsPastAutomationToo)
     EXPECT_EQ(curve.valueBehind(Day + host.inHost(6.0)), 0.75);
 }
 
+TEST_P(HostPreviewStretchTest, LeavesNoPointOfItsOwnWhoseValueIsRounded)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    host.addPoint(track, volume, host.inHost(5.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(7.0), 0.1F);
+    // Between the two the curve comes to values that no float is.
+    changes().clear();
+    host.carryOver("01:00:05:08", "01:00:06:09", "01:00:10:00", "01:00:11:01");
+    const auto points = [&] { return standin::tests::childrenOf(*host.curveOf(track, volume)).size(); };
+    ASSERT_EQ(points(), 2U);
+
+    for (int round = 0; round < 2; ++round) {
+        previewAll();
+        EXPECT_EQ(previewOffset(), Day);
+        adapter().setPreviewActive(false);
+        EXPECT_EQ(points(), 2U);
+    }
+
+    host.conform();
+    for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, volume)))
+        EXPECT_LT(point->getStart(nullptr), Day - host.origin);
+    adapter().setPreviewActive(true);
+    EXPECT_EQ(previewOffset(), Day);
+}
+
 // What an edit that failed has left.
 
 TEST_P(HostPreviewStretchTest, EmptiesWhatAFailedPreviewHasLeftOnceItIsSwitchedOff)

@@ -242,6 +242,11 @@ private:
     /// What of a track's events in a stretch the system hasn't written, in seconds from the time origin.
     std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
                                                                      const core::SecondsRange& stretch);
+    /// Removes the automation points in a stretch, in seconds from the time origin, where none follow. Emptying the stretch
+    /// would leave one at its start, as the values of the system's own points are rounded. Where others follow, the curve
+    /// needs it to go on before the stretch as it did.
+    static void removePoints(Velmark::IEditTransaction& transaction, const Track& track,
+                             const core::SecondsRange& stretch);
     /// By its role; an empty handle without one.
     Track newVideoTrack();
     /// Whether markers can be written there. On a track that the user has locked they would stay in the preview stretch.

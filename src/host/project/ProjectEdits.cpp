@@ -319,6 +319,9 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
     if (!isBefore(written, end))
         return;
     copyRange(pointersTo(tracks), written + offset, end + offset, written);
+    const double origin = timeOrigin();
+    for (const Track& track : tracks)
+        removePoints(transaction, track, {written + offset - origin, end + offset - origin});
     deleteRange(transaction, written + offset, end + offset);
 }
 

@@ -119,10 +119,11 @@ void Project::clearPreview(IEditTransaction& transaction)
         failure.ofStep([&] {
             for (const Track& track : tracks) {
                 spared.takeOff(track.container(), usersEvents(track, *stretch));
-                // The automation in the stretch goes where the system has written.
                 const std::optional<PreviewRecord> record = PreviewRecord::keptBy(track);
-                if (record && record->end())
+                if (record && record->end()) {
+                    removePoints(transaction, track, *stretch);
                     continue;
+                }
                 for (const Node& curve : curvesOf(*track.node()))
                     spared.takeOff(curve, pointsIn(*curve, *stretch));
             }
@@ -135,6 +136,17 @@ void Project::clearPreview(IEditTransaction& transaction)
         PreviewRecord::dropFrom(track);
     m_lockedTracks.clear();
     m_indexes.clear();
+}
+
+void Project::removePoints(IEditTransaction& transaction, const Track& track, const core::SecondsRange& stretch)
+{
+    for (const Node& curve : curvesOf(*track.node())) {
+        const std::vector<Node> points = childrenOf(*curve);
+        if (points.empty() || !isBefore(points.back()->getStart(nullptr), stretch.end))
+            continue;
+        for (const Node& point : pointsIn(*curve, stretch))
+            requireOk(transaction.remove(curve.get(), point.get()));
+    }
 }
 
 std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRange& stretch)
