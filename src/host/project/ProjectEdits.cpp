@@ -162,6 +162,7 @@ std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBas
     const double dstIn = changeEvent->dstIn().toSeconds(framerate);
     const double dstOut = changeEvent->dstOut().toSeconds(framerate);
 
+    findMarkerTracks();
     core::Cut::CutEvents cutEvents;
     for (const Track& track : cadrelTracks()) {
         // The markers of an earlier run aren't carried over: this run writes them anew. completeApply empties the memos'
@@ -183,6 +184,8 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
 {
     const double offset = requiredOffset();
     const core::EventBase& event = *cut.event();
+    if (m_model.isPreviewActive())
+        m_model.setProperty(core::PropertyKey::PreviewOrigin, core::Variant(timeOrigin()));
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
     for (const SourceGroup& group : groupsOf(cut)) {
@@ -285,6 +288,7 @@ void Project::markVirginTerritories(IEditTransaction& transaction, const core::C
 
 void Project::completeApply(IEditTransaction& transaction)
 {
+    findMarkerTracks();
     std::vector<Track> tracks = cadrelTracks();
     std::erase_if(tracks, [this](const Track& track) {
         return track.hostLocked() || !(isWanted(track) || isMarkerTrack(track));
@@ -305,10 +309,7 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
     const double offset = requiredOffset();
     m_indexes.clear();
     for (Track& track : tracks) {
-        if (isMarkerTrackOfRuns(track))
-            track.removeStartingIn(transaction, start, end);
-        else
-            track.removeRange(transaction, start, end);
+        track.removeRange(transaction, start, end);
         tick(1);
     }
     // What is before the stretch belongs to the real programme, and an edge there would leave automation points in it.
@@ -323,6 +324,7 @@ void Project::clearPreview(IEditTransaction& transaction)
 {
     const double offset = requiredOffset();
     setTracksLocked(false);
+    m_model.removeProperty(core::PropertyKey::PreviewOrigin);
     // Automation may reach further than the events, which alone make the end of the project.
     deleteRange(transaction, offset, offset + std::max(offset, projectEnd()));
 }
