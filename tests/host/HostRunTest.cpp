@@ -419,6 +419,24 @@ TEST_P(HostRunTest, WritesTheNewPictureAtItsPlace)
     EXPECT_DOUBLE_EQ(events[0]->getEnd(nullptr), host.inHost(9.0));
 }
 
+TEST_P(HostRunTest, TellsThatTheNewPictureIsNotWrittenOnATrackThatTheUserHasLocked)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:00:00"), core::Timecode("00:00:20:00")),
+        false);
+    host.conform();
+    EXPECT_TRUE(host.alerts->messages.empty());
+    query<ITrackNode>(host.trackNamed(u"New Video"))->setFlag(TrackFlag::Lock, true);
+
+    host.conform();
+
+    const Entries told{u"The track of the new video is locked. The new video hasn't been written."};
+    EXPECT_EQ(host.alerts->messages, told);
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(host.alerts->messages.size(), 2U);
+}
+
 TEST_P(HostRunTest, LetsTheAutomationRunStraightOverWhatNothingCovers)
 {
     host.model().changeEdl().clear();
