@@ -8,7 +8,6 @@
 #include "app/apply/HostedProject.h"
 #include "app/apply/KeptRun.h"
 #include "app/apply/Plausibility.h"
-#include "app/apply/ProgrammeShift.h"
 #include "app/apply/ProjectComparison.h"
 #include "app/apply/RunMaterial.h"
 #include "app/console/Failure.h"
@@ -20,6 +19,7 @@
 #include "app/edl/EventJson.h"
 #include "app/project/ProjectAccess.h"
 #include "app/project/ProjectClock.h"
+#include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
 #include "core/model/DataModel.h"
@@ -44,6 +44,7 @@ using core::EventFlaw;
 using core::EventList;
 using core::FrameRanges;
 using core::Framerate;
+using core::ProgrammeShift;
 using core::Settings;
 using core::Timecode;
 

@@ -515,6 +515,31 @@ TEST_P(HostRunTest, AMuteAtTheEndOfTheReelDoesNotReachBackIntoAnInsertOfAPreview
     EXPECT_EQ(standin::tests::childrenOf(*host.curveOf(track, volume)).size(), 3U);
 }
 
+TEST_P(HostRunTest, APreviewHoldsTheAutomationAfterItsEndAsARunDoes)
+{
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00");
+    host.addPoint(track, volume, host.inHost(1.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(19.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(19.0), 0.0F);
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(track, volume));
+    const auto isHeld = [&](double place) {
+        for (const double time : {4.0, 5.5, 19.5, 30.0, 3600.0})
+            EXPECT_NEAR(curve.valueBehind(place + host.inHost(time)).value_or(-1.0), 0.5, 1e-6) << time;
+    };
+    const auto points = [&] { return standin::tests::childrenOf(*host.curveOf(track, volume)).size(); };
+    host.adapter().setPreviewActive(true);
+
+    host.preview(host.model().changeEdl());
+    isHeld(host.adapter().getRunState().previewOffset);
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(points(), 3U) << "Nothing of it stays.";
+
+    host.conform();
+    isHeld(0.0);
+}
+
 TEST_P(HostRunTest, KeepsTheAutomationThatALaterEventBringsBetweenTwo)
 {
     host.model().changeEdl().clear();

@@ -234,7 +234,7 @@ void Project::setLocators(bool adjust, double left, double right)
 
 core::CadrelRunState Project::runState()
 {
-    return {&m_model.oldEdl(), &m_model.newEdl(), getFramerate(), &m_model.settings(), previewOffset()};
+    return {&m_model.oldEdl(), &m_model.newEdl(), getFramerate(), &m_model.settings(), previewOffset(), timeOrigin()};
 }
 
 core::CadrelPreviewState Project::previewState()

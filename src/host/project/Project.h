@@ -159,8 +159,9 @@ public:
     /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws Result::InvalidArgument for an entry
     /// whose kind is none of MarkerKind; earlier ones stay written.
     void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
-    /// Lets each curve keep the value that it has come to where the cuts leave a gap, and have its first one before the first
-    /// cut. With `isWholeProgramme` it keeps the last one after the last cut too, to the end of what the run replaces. The
+    /// Lets each curve keep the value that it has come to where the cuts leave a gap and after the last cut, to the end of
+    /// what the run replaces, and have its first one before the first cut. With `isWholeProgramme` it keeps the last one for
+    /// good, and otherwise nothing that clearPreview doesn't take away is left. The
     /// cuts are those that makeCut made, and their order doesn't matter.
     void holdAutomation(Velmark::IEditTransaction& transaction, const core::CutList& cuts, bool isWholeProgramme);
     /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what

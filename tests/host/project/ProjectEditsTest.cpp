@@ -828,7 +828,7 @@ protected:
     {
         cuts.clear();
         for (const auto& [dstIn, dstOut] : destinations)
-            cuts.add(host.adapter.makeCut(change("01:00:00:00", "01:00:10:00", dstIn, dstOut)));
+            cuts.add(host.adapter.makeCut(change(dstIn, dstOut, dstIn, dstOut)));
     }
 
     Result::Type mark()
@@ -989,13 +989,13 @@ TEST_P(ProjectVirginTerritoryTest, AutomationHasItsFirstValueBeforeTheFirstCut)
     EXPECT_EQ(points(track), (std::vector<double>{-3600.0, -3600.0, 30.0, 35.0, 45.0}));
 }
 
-TEST_P(ProjectVirginTerritoryTest, AutomationKeepsItsLastValueAfterTheLastCutOfARun)
+TEST_P(ProjectVirginTerritoryTest, AutomationKeepsItsLastValueAfterTheLastCut)
 {
-    const std::vector<double> before = points(track);
     listCuts({{"01:00:10:00", "01:00:20:00"}});
 
     hold(false);
-    EXPECT_EQ(points(track), before);
+    // In a preview up to a second before the end of what is cleared.
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, Day - 3601.0, Day - 3601.0}));
 
     hold(true);
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0}));
@@ -1013,6 +1013,18 @@ TEST_P(ProjectVirginTerritoryTest, ARestrictedRunHoldsTheAutomationInItsRange)
     settings().setPreserveMaterial(3635.0, 3640.0);
     listCuts({{"01:00:40:00", "01:00:50:00"}});
     hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, ACutIsAsLongAsItsMaterial)
+{
+    cuts.clear();
+    cuts.add(host.adapter.makeCut(change("01:00:00:00", "01:00:10:00", "01:00:10:00", "01:00:30:00")));
+    cuts.add(host.adapter.makeCut(change("01:00:10:00", "01:00:20:00", "01:00:30:00", "01:00:40:00")));
+
+    hold();
+
+    // From 20 s on there is nothing, though the first one is to last longer.
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
 }
 
