@@ -784,8 +784,8 @@ TEST(Apply, ASecondRunReplacesMarkersInAPreservedStretchAlone)
         EXPECT_EQ(
             placesOn("Destination", scene.project),
             (Places{{"Event: 1 - A001 ", {"0-10"}}, {"Event: 2 - A002 ", {"10-18"}}, {"Event: 3 - A003 ", {"22-32"}}}));
-        // The one that started in the stretch went whole, and of the new one the stretch takes its part.
-        EXPECT_EQ(placesOn("Insert", scene.project), (Places{{"Insert: B009", {"18-20"}}}));
+        // Of the new one the stretch takes its part, and of the old one what lies outside stays.
+        EXPECT_EQ(placesOn("Insert", scene.project), (Places{{"Insert: B009", {"18-20", "20-22"}}}));
     }
 }
 
