@@ -41,6 +41,7 @@ struct PropertyKey {
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
         ProjectEnd = 10021,             ///< double, from the time origin, as it stood when the preview went on
+        PreviewOrigin = 10022,          ///< double, the time origin when the preview stretch was written
     };
 };
 
