@@ -16,9 +16,9 @@ struct ParentType {
     static constexpr const char* X11Window = "X11Window";
 };
 
-/// The keys without a character: the `virtualKey` of IPlugView::onKeyDown and onKeyUp.
+/// The keys without a character: the `virtualKey` of IPlugView::onKeyDown and onKeyUp, which is 0
+/// for all others.
 struct VirtualKey {
-    static constexpr int32 None = 0;
     static constexpr int32 Backspace = 1;
     static constexpr int32 Tab = 2;
     static constexpr int32 Return = 3;
