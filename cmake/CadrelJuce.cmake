@@ -9,7 +9,7 @@ find_package(PNG REQUIRED)
 find_package(Threads REQUIRED)
 find_package(ZLIB REQUIRED)
 
-find_package(X11 REQUIRED COMPONENTS Xext Xinerama Xrandr Xcursor)
+find_package(X11 REQUIRED COMPONENTS Xext Xinerama Xrandr Xcursor OPTIONAL_COMPONENTS Xtst)
 
 # cadrel_juce_library(name MODULE module... [OPTIONS option...]): the modules, compiled with the options alone or, without any,
 # as all else is.

@@ -169,7 +169,8 @@ int32 JuceGuiAdapter::onSize(const ViewRect& rect)
 int32 JuceGuiAdapter::onFocus(bool state)
 {
     return resultOf([&] {
-        if (state && m_content && isShowing())
+        // A host may say so again while a field of the content has it.
+        if (state && m_content && isShowing() && !hasKeyboardFocus(true))
             m_content->grabKeyboardFocus();
     });
 }
@@ -208,7 +209,8 @@ void JuceGuiAdapter::resized()
 
 void JuceGuiAdapter::layOutContent()
 {
-    if (!m_content || getWidth() <= 0 || getHeight() <= 0)
+    // A window of ours has at least one pixel, also where the host has left none.
+    if (!m_content || widthOf(rect()) <= 0 || heightOf(rect()) <= 0)
         return;
     const juce::ScopedValueSetter<bool> layingOut(m_isLayingOut, true);
     const double widthShare = static_cast<double>(getWidth()) / MinimumWidth;
