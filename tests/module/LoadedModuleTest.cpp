@@ -33,7 +33,6 @@ using namespace Velmark;
 using cadrel::tests::VirtualScreen;
 using cadrel::tests::XWindows;
 using standin::Application;
-using standin::ModuleError;
 using standin::ModuleLoader;
 
 namespace fs = std::filesystem;
@@ -355,14 +354,6 @@ TEST_F(LoadedModuleTest, OpensNoWindowWhereTheHostHasNone)
 
     EXPECT_FALSE(openWindow());
     EXPECT_EQ(m_application.windowFactories().factories().front()->getWindow(), nullptr);
-}
-
-TEST(ModuleLoader, TellsWhyAFileIsNoModule)
-{
-    Application application;
-    EXPECT_THROW(ModuleLoader(application, "/nowhere/Cadrel.so", resources()), ModuleError);
-    // A shared object without the three functions.
-    EXPECT_THROW(ModuleLoader(application, "/lib/x86_64-linux-gnu/libm.so.6", resources()), ModuleError);
 }
 
 TEST_F(LoadedModuleTest, SurvivesItsUnloadingWithTheWindowOpenAndUndoAfterwards)
