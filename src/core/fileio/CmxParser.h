@@ -21,8 +21,8 @@ namespace cadrel::core::fileio {
 struct EventLine;
 
 /// Reads CMX EDLs. It skips what it doesn't know, but checks each field: a line that is neither an event nor a comment
-/// is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. Only an event line
-/// with too few columns disappears.
+/// is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. An event line with too
+/// few columns makes no event. The remarks tell of all lines that hold an event and made none.
 ///
 ///     FCM: NON-DROP FRAME
 ///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
