@@ -81,7 +81,8 @@ Examples:
 constexpr const char* ListHelp =
     R"(Each event is "ok", or its state says which kind of flaw it has: "format" for a field that can't be read,
 "timecode" for a time that doesn't exist at the frame rate, "range" for an end before its start. What is wrong
-stands under the event. With --json - only the JSON goes to standard output.
+stands under the event. A line that makes no event is named in a warning. With --json - only the JSON goes to
+standard output.
 
 Examples:
   cadrel list reel3_v12.edl
