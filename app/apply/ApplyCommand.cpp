@@ -126,7 +126,7 @@ FileShifts shiftsOf(const ApplyOptions& options)
 /// What the change EDL of the model was made of.
 struct ChangeSource {
     std::optional<Cuts> cuts; ///< nothing when it was given
-    std::vector<std::string> fileNames;
+    ReadFiles files;          ///< its files then
 };
 
 /// Puts the change EDL into the model, and both cuts when it is made of them. Throws Failure.
@@ -299,7 +299,8 @@ public:
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
-        m_facts.changeNames = source.fileNames;
+        m_facts.changeNames = source.files.names;
+        m_facts.changeUnread = source.files.unread;
         m_facts.written = targetOf(options);
         m_facts.jsonFile = JsonOutput::isFile(options.jsonFile) ? options.jsonFile : std::string();
         const Plausibility plausibility(model, options.projectFile, m_edls);

@@ -365,7 +365,8 @@ TEST(Apply, TheReportHasTheEventsAndWhatTheCutsHold)
 
     EXPECT_EQ(report.at("project"), "scene.stage");
     EXPECT_EQ(report.at("rate"), "24 fps");
-    EXPECT_EQ(report.at("old"), (json{{"files", {"old.edl"}}, {"events", 3}, {"invalid", 0}}));
+    EXPECT_EQ(report.at("old"),
+              (json{{"files", {"old.edl"}}, {"events", 3}, {"invalid", 0}, {"unread", json::array()}}));
     EXPECT_EQ(report.at("events").size(), 2U);
     EXPECT_EQ(report.at("applied"), 2);
     EXPECT_EQ(report.at("passedOver"), json::array());
@@ -884,6 +885,56 @@ TEST(Apply, ABrokenModelIsToldOfAndReplaced)
     EXPECT_TRUE(tells(outcome.err, "An error occurred while loading the Cadrel data. The data will be ignored."))
         << outcome.err;
     EXPECT_EQ(scene.apply({"--force"}).err, "");
+}
+
+TEST(Apply, LinesThatCannotBeReadAreToldAndStrictWritesNothing)
+{
+    const Scene scene;
+    scene.folder.write("new.edl", newCut() + "005  A005  V  C  10:00:00:00 10:00:01:00 01:00:32:00\n");
+    const std::string what = "line 10 misses a field and isn't read: "
+                             "\"005  A005  V  C  10:00:00:00 10:00:01:00 01:00:32:00\"; "
+                             "correct the list, and save it as plain text\n";
+    const std::string before = contentOf(scene.project);
+
+    const Outcome warned = scene.apply();
+    const Outcome strict = scene.apply({"--strict", "--in-place"});
+
+    EXPECT_EQ(warned.status, 0);
+    EXPECT_EQ(warned.err, "cadrel: " + scene.newFile + ": warning: " + what);
+    EXPECT_TRUE(tells(warned.out, "New cut     new.edl: 4 events, all valid, 1 line not read\n")) << warned.out;
+    EXPECT_EQ(scene.applyAsJson().at("new").at("unread").at(0).at("line"), 10);
+    EXPECT_EQ(strict.status, 1);
+    EXPECT_EQ(strict.err, "cadrel: " + scene.newFile + ": " + what);
+    EXPECT_EQ(contentOf(scene.project), before);
+}
+
+TEST(Apply, AShotThatIsReversedNowTakesNoSoundAlong)
+{
+    const Scene scene;
+    const std::string reversal = "M2   A002       -024.0                11:00:02:12\n";
+    std::string reversed = newCut();
+    reversed.insert(reversed.find("003  B009"), reversal);
+    scene.folder.write("new.edl", reversed);
+
+    const json report = scene.applyAsJson();
+
+    for (const json& event : report.at("events"))
+        EXPECT_NE(event.at("roll"), "A002") << event;
+    EXPECT_EQ(report.at("inserts").at(0).at("dstIn"), "01:00:10:00");
+}
+
+TEST(Apply, AProjectWithReversedShotsIsKnownAgain)
+{
+    const Scene scene;
+    std::string reversed = newCut();
+    reversed.insert(reversed.find("003  B009"), "M2   A002       -024.0                11:00:02:12\n");
+    scene.folder.write("new.edl", reversed);
+    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+    const std::string next = scene.folder.write("next.edl", reversed);
+
+    const Outcome outcome = runCadrel({"apply", scene.project, "--old", scene.newFile, "--new", next, "--summary"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
 }
 
 TEST(Apply, TheProjectHasToRunAtTheRateThatIsGiven)
