@@ -151,7 +151,8 @@ void ApplyListing::printTotals(std::ostream& out) const
         out << m_facts.generation->cutsText(rate) << m_facts.generation->changeText();
     else
         out << "Frame rate  " << rate << '\n'
-            << "Change EDL  " << describeEvents(model.changeEdl(), m_facts.changeNames) << '\n';
+            << "Change EDL  " << describeEvents(model.changeEdl(), m_facts.changeNames, countOf(m_facts.changeUnread))
+            << '\n';
     const auto timeText = [this](double seconds) { return m_clock.exactTimecode(seconds - m_facts.timeOrigin); };
     const std::vector<std::string> settings = unusualSettings(model.settings(), timeText);
     if (!settings.empty())

@@ -4,10 +4,12 @@
 
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
+#include "core/edl/EventBase.h"
 #include "core/edl/HealedEvent.h"
 #include "core/model/DataModel.h"
 #include "core/time/Timecode.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace cadrel::app {
@@ -21,9 +23,13 @@ using nlohmann::ordered_json;
 
 namespace {
 
-ordered_json sideToJson(const EventList& events, const std::vector<std::string>& names)
+ordered_json sideToJson(const EventList& events, const std::vector<std::string>& names,
+                        const std::vector<UnreadOfFile>& unread)
 {
-    return {{"files", names}, {"events", events.size()}, {"invalid", events.countInvalid()}};
+    return {{"files", names},
+            {"events", events.size()},
+            {"invalid", events.countInvalid()},
+            {"unread", app::toJson(unread)}};
 }
 
 /// "93.6".
@@ -35,11 +41,14 @@ std::string percentOf(const Coverage& coverage)
 
 } // namespace
 
-std::string describeEvents(const EventList& events, const std::vector<std::string>& names)
+std::string describeEvents(const EventList& events, const std::vector<std::string>& names, std::size_t unreadLines)
 {
     const std::size_t invalid = events.countInvalid();
+    const auto reversed = std::ranges::count_if(events.events(), [](const auto& event) { return event->isReversed(); });
     return toPrintable(joined(names)).text + ": " + counted(events.size(), "event") + ", " +
-           (invalid == 0 ? "all valid" : std::to_string(invalid) + " invalid");
+           (invalid == 0 ? "all valid" : std::to_string(invalid) + " invalid") +
+           (reversed == 0 ? "" : ", " + std::to_string(reversed) + " reversed") +
+           (unreadLines == 0 ? "" : ", " + counted(unreadLines, "line") + " not read");
 }
 
 GenerationReport::GenerationReport(const DataModel& model, const EventList& carried, Cuts cuts,
@@ -56,8 +65,8 @@ GenerationReport::GenerationReport(const DataModel& model, const EventList& carr
 
 std::string GenerationReport::cutsText(const std::string& rate) const
 {
-    return "Old cut     " + describeEvents(m_model.oldEdl(), m_cuts.oldNames) + "\n" + //
-           "New cut     " + describeEvents(m_model.newEdl(), m_cuts.newNames) + "\n" + //
+    return "Old cut     " + describeEvents(m_model.oldEdl(), m_cuts.oldNames, countOf(m_cuts.oldUnread)) + "\n" + //
+           "New cut     " + describeEvents(m_model.newEdl(), m_cuts.newNames, countOf(m_cuts.newUnread)) + "\n" + //
            "Frame rate  " + rate + "\n";
 }
 
@@ -96,8 +105,9 @@ ordered_json GenerationReport::toJson() const
                            {"shot", insert.shot},
                            {"moreShots", insert.moreShots}});
     }
-    return {{"old", sideToJson(m_model.oldEdl(), m_cuts.oldNames)},
-            {"new", sideToJson(m_model.newEdl(), m_cuts.newNames)},
+    return {{"old", sideToJson(m_model.oldEdl(), m_cuts.oldNames, m_cuts.oldUnread)},
+            {"new", sideToJson(m_model.newEdl(), m_cuts.newNames, m_cuts.newUnread)},
+            {"unmatched", m_cuts.unmatched},
             {"healed", {{"events", m_healedEvents}, {"members", m_healedMembers}}},
             {"programmeFrames", m_coverage.programmeFrames},
             {"coveredFrames", m_coverage.coveredFrames},

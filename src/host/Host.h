@@ -183,6 +183,8 @@ private:
     util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                   std::uint32_t options);
     util::Result::Type finishPreview(const EntryName& name);
+    /// Tells the user when his lock has kept the new video from its track.
+    static void tellOfVideo(bool isWritten);
 
     // The user may close or leave the project while the progress window lets events through. So the project is held, and
     // the edit ends as soon as it isn't the active one any more.

@@ -163,7 +163,6 @@ Result::Type Host::applyVirginTerritories(core::CutList& cuts)
     const Result::Type result = CadrelerBase::applyVirginTerritories(cuts);
     if (result != Result::Ok || !project)
         return result;
-    // A preview is cleared again, and what it would leave at its end would stay.
     project->holdAutomation(openTransaction(), cuts, m_served == core::ActionChangeContext::Run);
     if (!project->model().settings().createVirginTerritories())
         return result;

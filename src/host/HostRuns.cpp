@@ -157,6 +157,7 @@ Result::Type Host::runCadrel()
     const core::EventList& changeList = project.model().changeEdl();
     return withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
         Counted<IActionManager> actions; // once the user has cancelled
+        bool isVideoWritten = true;
         const Result::Type result = edit(project, Apply, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle);
@@ -171,7 +172,7 @@ Result::Type Host::runCadrel()
             requireSuccess(ran);
             requireActive(project);
             project.createVideoTracks(transaction);
-            m_videoProvider->apply(true, transaction, 0.0);
+            isVideoWritten = m_videoProvider->apply(true, transaction, 0.0);
             double start = 0.0;
             double end = 0.0;
             project.getApplyRange(start, end);
@@ -182,6 +183,7 @@ Result::Type Host::runCadrel()
             takeBack(project, *actions);
             throw Result::Cancelled;
         }
+        tellOfVideo(isVideoWritten);
     });
 }
 
@@ -193,6 +195,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
         return Result::NoProject;
     Project& project = *held;
     return withProgress(project, {L"Project Preview", false}, events.size(), [&] {
+        bool isVideoWritten = true;
         requireSuccess(edit(project, Preview, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle, m_modelSnapshot);
@@ -202,7 +205,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
             requireSuccess(CadrelerBase::startPreview(events, first, last, options));
             requireActive(project);
             const double offset = project.previewOffset();
-            m_videoProvider->apply(true, transaction, offset);
+            isVideoWritten = m_videoProvider->apply(true, transaction, offset);
             // Without material in the preview the project ends before it.
             project.closeRange(isOnlySelected(project.model().settings()), offset,
                                std::max(offset, project.projectEnd()));
@@ -213,6 +216,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
         }));
         requireActive(project);
         requireSuccess(cycleToEvents(events, first, last, options));
+        tellOfVideo(isVideoWritten);
     });
 }
 
@@ -234,6 +238,12 @@ Result::Type Host::finishPreview(const EntryName& name)
         requireSuccess(CadrelerBase::endPreview());
         project.resetPreviewOffset();
     });
+}
+
+void Host::tellOfVideo(bool isWritten)
+{
+    if (!isWritten)
+        showAlert(L"The track of the new video is locked. The new video hasn't been written.");
 }
 
 Result::Type Host::withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,

@@ -22,7 +22,9 @@
 #include "tests/support/host/AlteredContext.h"
 #include "tests/support/standin/Heard.h"
 #include "tests/support/standin/RandomProject.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/Attributes.h"
+#include "velmark/String.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -42,6 +44,7 @@ using core::Timecode;
 using standin::tests::Chance;
 using util::Result;
 using Velmark::AttributeKey;
+using Velmark::ConstString;
 using Velmark::Counted;
 using Velmark::FrameRateInfo;
 using Velmark::FVariant;
@@ -163,6 +166,32 @@ public:
         const double inside = end ? edge - Hair : edge + Hair;
         const auto source = sourceOf(inside);
         return source ? std::optional(Side{*source + (end ? Hair : -Hair), end.has_value()}) : std::nullopt;
+    }
+    struct Warning {
+        double start;
+        double end;
+        std::string text;
+    };
+    /// The automation warnings of the run; nothing where the user has locked their track.
+    std::optional<std::vector<Warning>> warnings() const
+    {
+        for (standin::Track* const track : project.allTracks()) {
+            FVariant role;
+            if (track->kind() != standin::Track::Kind::Marker ||
+                track->getAttribute(AttributeKey::MarkerType, role) != ResultOk || !role.isInteger() ||
+                (role.asInteger() & 0xff) != TrackRole::AutomationWarning)
+                continue;
+            if (track->isLocked())
+                return std::nullopt;
+            std::vector<Warning> found;
+            for (const auto& marker : standin::tests::childrenOf(*track)) {
+                const std::string text = ConstString(marker->getName()).text8();
+                if (text.starts_with("Automation warning in "))
+                    found.push_back({marker->getStart(nullptr), marker->getEnd(nullptr), text.substr(21)});
+            }
+            return found;
+        }
+        return std::nullopt;
     }
     bool isRestricted() { return model().settings().restrictRange(); }
     /// Whether the run replaces what stands at the instant.

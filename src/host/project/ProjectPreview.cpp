@@ -154,8 +154,8 @@ std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRa
     std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
     if (const auto record = PreviewRecord::keptBy(track))
         events = record->others(std::move(events));
-    if (findTrack(markerTrack(TrackRole::Memos), TypeWord::Marker, TrackRole::Memos) &&
-        track == markerTrack(TrackRole::Memos)) {
+    findMarkerTracks();
+    if (track == markerTrack(TrackRole::Memos)) {
         // What the user has made of the copy of a memo is in the memo itself.
         std::set<std::int64_t> ids;
         for (const HostEvent& memo : track.clipEvents()) {
@@ -178,11 +178,13 @@ void Project::findPreviewedTracks()
     }
 }
 
-bool Project::isWhereWritten(const Track& memos) const
+std::optional<double> Project::writtenFrom()
 {
-    const std::optional<PreviewRecord> record = PreviewRecord::keptBy(memos);
-    const double start = requiredOffset() - timeOrigin();
-    return !record || (!isBefore(record->start(), start) && !isBefore(start, record->start()));
+    for (const Track& track : cadrelTracks()) {
+        if (const auto record = PreviewRecord::keptBy(track))
+            return record->start();
+    }
+    return std::nullopt;
 }
 
 double Project::latestPoint(const std::vector<Track>& tracks) const
