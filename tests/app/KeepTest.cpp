@@ -637,13 +637,124 @@ void expectDoubt(const Job& job, const std::string& words)
     EXPECT_EQ(forced.status, 0) << forced.err;
 }
 
-TEST(Plausibility, TheSameRunTwiceIsRefused)
+/// Runs, and puts the result in the place of the project.
+void carryOver(const Job& job, const Words& words)
+{
+    Words all{"apply", job.project, "--in-place"};
+    all.insert(all.end(), words.begin(), words.end());
+    const Outcome outcome = runCadrel(all);
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+}
+
+void expectRefusedAgain(const Job& job, const Words& words, const std::string& why)
+{
+    Words all{"apply", job.project};
+    all.insert(all.end(), words.begin(), words.end());
+    const Outcome outcome = runCadrel(all);
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(tells(outcome.err, why)) << outcome.err;
+    all.emplace_back("--force");
+    EXPECT_EQ(runCadrel(all).status, 0);
+}
+
+TEST(Plausibility, TheSameRunTwiceIsRefusedWhereverTheChangeIs)
+{
+    const Reel longer = threeShots().shot("D", 400, 10);
+    const Reel shorter = Reel(Hour).shot("A", 100, 10).shot("B", 200, 10);
+    const Reel trimmed = Reel(Hour).shot("A", 100, 10).shot("B", 200, 10).shot("C", 300, 9);
+    const Reel lifted = Reel(Hour).shot("A", 100, 10).at(Hour + 20).shot("C", 300, 10);
+    const Reel later = Reel(Hour + 2).shot("A", 102, 8).shot("B", 200, 10).shot("C", 300, 10);
+    const std::vector<std::pair<Reel, std::string>> changes{{withInsert(), "01:00:10:00"}, {longer, "01:00:30:00"},
+                                                            {shorter, "01:00:20:00"},      {trimmed, "01:00:29:00"},
+                                                            {lifted, "01:00:10:00"},       {later, "01:00:00:00"}};
+    for (const auto& [changed, place] : changes) {
+        SCOPED_TRACE(place);
+        const Job job(threeShots(), changed, soundOfThreeShots());
+        const Words words{"--old", job.oldFile, "--new", job.newFile};
+        carryOver(job, words);
+
+        expectRefusedAgain(
+            job, words, "was last carried over to another cut than the old one given; they differ first at " + place);
+    }
+}
+
+TEST(Plausibility, ReelOneAgainAfterReelTwoIsRefused)
 {
     const Job job(threeShots(), withInsert(), soundOfThreeShots());
-    ASSERT_EQ(job.run().status, 0);
-    std::filesystem::rename(job.result, job.project);
+    json project = json::parse(contentOf(job.project));
+    project["tracks"][0]["events"].push_back(clip("d", 2 * Hour, 2 * Hour + 20));
+    writeFile(job.project, project.dump());
+    const auto oldFile = job.folder.write("old2.edl", Reel(2 * Hour).shot("D", 400, 10).shot("E", 500, 10).text());
+    const auto newFile = job.folder.write("new2.edl", Reel(2 * Hour).shot("D", 400, 10).shot("E", 502, 8).text());
+    const auto next = job.folder.write("next.edl", Reel(Hour).shot("A", 100, 10).shot("N", 50, 4).text());
+    const Words first{"--old", job.oldFile, "--new", job.newFile};
+    const Words second{"--old", oldFile, "--new", newFile};
+    carryOver(job, first);
+    carryOver(job, second);
 
-    expectDoubt(job, "was last carried over to another cut than the old one given; they differ first at 01:00:10:00");
+    expectRefusedAgain(job, first, "they differ first at 01:00:10:00");
+    expectRefusedAgain(job, second, "they differ first at 02:00:10:00");
+    // From where it is now it goes on.
+    carryOver(job, {"--old", job.newFile, "--new", next, "--force"});
+    carryOver(job, {"--old", next, "--new", job.newFile});
+}
+
+TEST(Plausibility, APartOfTheCutThatTheProjectHasIsNoDoubt)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    carryOver(job, {"--old", job.oldFile, "--new", job.newFile});
+    const auto part = job.folder.write("part.edl", Reel(Hour + 14).shot("B", 200, 10).text());
+    const auto shorter = job.folder.write("shorter.edl", Reel(Hour + 14).shot("B", 200, 8).text());
+
+    carryOver(job, {"--old", part, "--new", shorter});
+}
+
+TEST(Plausibility, EventsThatAreFlawedCompareEqualWithThoseThatTheProjectStores)
+{
+    Reel flawed = threeShots();
+    const Job job(flawed, flawed, soundOfThreeShots());
+    writeFile(job.oldFile, flawed.text() + cut("004", "D", "xx:00:00:00 00:00:10:00", "01:00:30:00 01:00:35:00") +
+                               cut("005", "E", "00:00:99:00 00:01:00:00", "01:00:35:00 01:00:40:00"));
+    const Words words{"--old", job.oldFile, "--new", job.oldFile};
+    carryOver(job, words);
+
+    carryOver(job, words);
+}
+
+TEST(Plausibility, TheSameChangeEdlTwiceIsRefused)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    const auto change = job.folder.write(
+        "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:15:00 01:00:20:00", "01:00:10:00 01:00:15:00") +
+                          cut("002", "B", "01:00:10:00 01:00:15:00", "01:00:15:00 01:00:20:00"));
+    const auto other = job.folder.write(
+        "other.edl", "TITLE: CHANGE\n" + cut("001", "C", "01:00:20:00 01:00:25:00", "01:00:25:00 01:00:30:00") +
+                         cut("002", "C", "01:00:25:00 01:00:30:00", "01:00:20:00 01:00:25:00"));
+    const std::string why = "has been carried out in the project already";
+    carryOver(job, {"--change", change});
+
+    expectRefusedAgain(job, {"--change", change}, why);
+    carryOver(job, {"--change", other});
+    expectRefusedAgain(job, {"--change", change}, why);
+    expectRefusedAgain(job, {"--change", other}, why);
+}
+
+TEST(Plausibility, TheChangeEdlOfTwoCutsAndTheCutsThemselvesAreTheSameRun)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    const std::string change = job.folder / "change.edl";
+    const Words cuts{"--old", job.oldFile, "--new", job.newFile};
+    Words generate{"generate", "--rate", "24 fps", "-o", change};
+    generate.insert(generate.end(), cuts.begin(), cuts.end());
+    ASSERT_EQ(runCadrel(generate).status, 0);
+    const std::string untouched = contentOf(job.project);
+    const std::string why = "has been carried out in the project already";
+
+    carryOver(job, cuts);
+    expectRefusedAgain(job, {"--change", change}, why);
+    writeFile(job.project, untouched);
+    carryOver(job, {"--change", change, "--force"});
+    expectRefusedAgain(job, cuts, why);
 }
 
 TEST(Plausibility, ReelTwoAfterReelOneIsNoDoubt)

@@ -41,6 +41,7 @@ struct PropertyKey {
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
         ProjectEnd = 10021,             ///< double, from the time origin, as it stood when the preview went on
+        EarlierRuns = 10022,            ///< string, the bytes of PastRuns without the run that the lists tell of
     };
 };
 
