@@ -318,6 +318,96 @@ TEST(Keep, BeforeOneChangeNothingMovesAndAfterItEverythingByTheSame)
     }
 }
 
+/// A curve of those points, in seconds from the start of the film and values.
+json curveOf(const std::vector<std::pair<double, double>>& places)
+{
+    json points = json::array();
+    for (const auto& [time, value] : places)
+        points.push_back({{"time", Hour + time}, {"value", value}});
+    return json::array({{{"number", 1}, {"automates", "volume"}, {"points", points}}});
+}
+
+const json& pointsOf(const json& track)
+{
+    return track["curves"][0]["points"];
+}
+
+/// Whether the curves of two tracks have the same value at those times, in seconds from the start of the film.
+void expectSameLevel(const json& was, double time, const json& now, double newTime)
+{
+    EXPECT_NEAR(valueAt(pointsOf(now), Hour + newTime), valueAt(pointsOf(was), Hour + time), 1e-6)
+        << time << " to " << newTime;
+}
+
+TEST(Keep, OverPictureThatWasReplacedTheAutomationKeepsTheLevelFromBefore)
+{
+    const Reel replaced = Reel(Hour).shot("A", 100, 10).shot("N", 50, 10).shot("C", 300, 10);
+    json sound = soundOfThreeShots();
+    sound[0]["curves"] = curveOf({{1, 0.25}, {8, 0.75}, {13, 0.5}, {25, 0.1}, {200, 0.9}});
+    const Job job(threeShots(), replaced, sound);
+
+    ASSERT_EQ(job.run().status, 0);
+
+    const json was = trackIn(job.project, "DIA");
+    const json now = trackIn(job.result, "DIA");
+    for (const double time : {0.0, 5.0, 9.9, 20.1, 24.0, 30.0, 150.0, 300.0})
+        expectSameLevel(was, time, now, time);
+    for (const double time : {10.1, 15.0, 19.9})
+        EXPECT_NEAR(valueAt(pointsOf(now), Hour + time), 0.65, 1e-6) << time;
+}
+
+TEST(Keep, OverGrownPictureTheAutomationKeepsTheLevelFromBefore)
+{
+    // B has lost its first two seconds, and four of a new shot stand before it.
+    const Reel grown = Reel(Hour).shot("A", 100, 10).shot("N", 50, 4).shot("B", 202, 8).shot("C", 300, 10);
+    json sound = soundOfThreeShots();
+    sound[0]["curves"] = curveOf({{9, 0.25}, {11, 0.75}, {13, 0.5}});
+    const Job job(threeShots(), grown, sound);
+
+    ASSERT_EQ(job.run().status, 0);
+
+    const json now = trackIn(job.result, "DIA");
+    for (const double time : {9.99, 10.01, 12.0, 13.99})
+        EXPECT_NEAR(valueAt(pointsOf(now), Hour + time), 0.5, 0.01) << time;
+    EXPECT_NEAR(valueAt(pointsOf(now), Hour + 14.01), 0.625, 0.01);
+    expectSameLevel(trackIn(job.project, "DIA"), 12.5, now, 14.5);
+}
+
+TEST(Keep, ACurveThatGoesOnBeyondTheChangeHasNoStrayPoints)
+{
+    const Reel lifted = Reel(Hour).shot("A", 100, 10).shot("C", 300, 10);
+    const Reel replaced = Reel(Hour).shot("A", 100, 10).shot("N", 50, 10).shot("C", 300, 10);
+    const std::vector<std::vector<std::pair<double, double>>> curves{
+        {{1, 0.25}, {8, 0.75}, {13, 0.5}, {25, 0.3}},
+        {{1, 0.1}, {25, 0.3}, {100, 0.7}},
+        {{200, 0.9}, {4000, 0.3}},
+        {{-3000, 0.2}, {-100, 0.6}},
+        {{8, 0.75}, {15, 0.75}, {15, 0.2}, {25, 0.1}, {80000, 0.7}}};
+    for (const Reel& changed : {withInsert(), lifted, replaced}) {
+        for (const auto& curve : curves) {
+            SCOPED_TRACE(testing::Message() << changed.text() << json(curve));
+            json sound = soundOfThreeShots();
+            sound[0]["curves"] = curveOf(curve);
+            const Job job(threeShots(), changed, sound);
+
+            ASSERT_EQ(job.run().status, 0);
+
+            const json was = pointsOf(trackIn(job.project, "DIA"));
+            const json now = pointsOf(trackIn(job.result, "DIA"));
+            for (const json& point : was) {
+                if (point.at("time") < Hour + 10 || point.at("time") > Hour + 100) {
+                    EXPECT_NE(std::find(now.begin(), now.end(), point), now.end()) << point;
+                }
+            }
+            for (const json& point : now) {
+                const double time = point.at("time");
+                const bool isChanged = Hour + 10 <= time && time <= Hour + 40;
+                EXPECT_TRUE(isChanged || std::find(was.begin(), was.end(), point) != was.end()) << point;
+            }
+        }
+    }
+}
+
 /// The tracks of a project whose content a run may change, those in folders too; without those that runs write on.
 std::vector<json> changeableTracks(const json& tracks)
 {
