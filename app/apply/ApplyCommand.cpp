@@ -347,6 +347,7 @@ private:
         m_kept.emplace(model, m_hosted.project(), m_clock,
                        isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_options.isForced, m_edls);
         m_facts.isRunNeeded = m_kept->needsRun();
+        m_facts.isHeldBack = m_kept->plan().isHeldBack;
         const Framerate framerate = Timecode::framerate();
         for (const core::FrameRange& range : m_kept->plan().lost)
             m_facts.lost.push_back({range.start / framerate.rate, range.end / framerate.rate});

@@ -6,6 +6,7 @@
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
 #include "core/edl/EventBase.h"
+#include "core/edl/ProgrammePlace.h"
 #include "core/keep/Material.h"
 #include "core/keep/PastRuns.h"
 #include "core/keep/PictureLine.h"
@@ -82,8 +83,7 @@ void countNames(const EventList& events, const Settings& settings, NameCount& co
     versions.compileEnabled(settings.vfxPatterns());
     for (const auto& event : events.events()) {
         const std::string& name = settings.matchBy() == MatchBy::ClipName ? event->clipName() : event->rollName();
-        const bool isBlack = event->rollName() == "BL" || event->rollName() == "BLACK";
-        if (!isBlack && !event->hasFlaw(EventFlaw::NotVideoEvent))
+        if (!isBlack(*event) && !event->hasFlaw(EventFlaw::NotVideoEvent))
             ++count[versions.stripVersion(name)];
     }
 }

@@ -611,6 +611,19 @@ TEST(Keep, TheRangeThatTheUserPreservesIsStoredAndNotThatOfTheRun)
               (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3620", "c 3620-3630", "tail 3631-3633"}));
 }
 
+TEST(Keep, AChangeOutsideOfTheStretchThatMayChangeIsToldAsSuch)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+
+    const Outcome outcome = job.run({"--preserve", "01:00:00:00", "01:00:10:00"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_TRUE(tells(outcome.out,
+                      "Applied     nothing, since all that would change lies outside of the stretch that may change\n"))
+        << outcome.out;
+    EXPECT_EQ(tracksIn(job.result), tracksIn(job.project));
+}
+
 TEST(Keep, OutsideOfTheHullOfAGivenChangeEdlNothingIsTouched)
 {
     // The two halves of B change places.
@@ -644,7 +657,8 @@ TEST(Keep, WhatStandsInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
     EXPECT_FALSE(std::filesystem::exists(job.result));
     const Outcome forced = runCadrel({"apply", job.project, "--change", change, "--force", "-o", job.result});
     EXPECT_EQ(forced.status, 0) << forced.err;
-    EXPECT_TRUE(tells(forced.out, "Lost        01:00:20:00 - 01:00:24:00, for want of room\n")) << forced.out;
+    EXPECT_TRUE(tells(forced.out, "Lost        01:00:20:00 - 01:00:24:00, which the change EDL carries nowhere\n"))
+        << forced.out;
     EXPECT_EQ(placesOn("DIA", job.result),
               (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3624", "c 3624-3630", "tail 3631-3633"}));
 }
@@ -938,8 +952,8 @@ TEST(Shift, FilesOfOneCutOnTheSameTimecodeAreRefusedWithTheShiftThatPartsThem)
 
     EXPECT_EQ(refused.status, 1);
     EXPECT_EQ(refused.err, "cadrel: " + reels.second +
-                               ": lies on the same timecode as another file of its cut; give --shift "
-                               "r2.edl=+01:00:00:00\n");
+                               ": lies on the same timecode as another file of its cut; give --shift " + reels.second +
+                               "=+01:00:00:00\n");
     words.insert(words.end(), {"--shift", "r2.edl=+01:00:00:00"});
     const Outcome parted = runCadrel(words);
     EXPECT_EQ(parted.status, 0) << parted.err;
@@ -955,7 +969,33 @@ TEST(Shift, AtTheEndOfTheDayFilesArePartedBackwards)
     const Outcome outcome = runCadrel({"generate", "--rate", "24 fps", "--old", first, second, "--new", first});
 
     EXPECT_EQ(outcome.status, 0);
-    EXPECT_TRUE(tells(outcome.err, "give --shift r2.edl=-01:00:00:00")) << outcome.err;
+    EXPECT_TRUE(tells(outcome.err, "give --shift " + second.string() + "=-01:00:00:00")) << outcome.err;
+}
+
+TEST(Shift, FilesOfOneNameOnBothSidesArePartedByTheirPaths)
+{
+    const TempFolder folder;
+    const std::string first = Reel(Hour).shot("A", 100, 10).text();
+    const std::string second = Reel(Hour).shot("B", 100, 10).text();
+    Words words{"generate", "--rate", "24 fps", "-o", folder / "change.edl"};
+    Words shifts;
+    for (const char* side : {"old", "new"}) {
+        std::filesystem::create_directory(folder / side);
+        const std::string name = folder / side;
+        writeFile(name + "/r1.edl", first);
+        writeFile(name + "/r2.edl", second);
+        words.insert(words.end(), {std::string("--") + side, name + "/r1.edl", name + "/r2.edl"});
+        shifts.insert(shifts.end(), {"--shift", name + "/r2.edl=+01:00:00:00"});
+    }
+
+    const Outcome warned = runCadrel(words);
+    for (const std::size_t index : {1U, 3U})
+        EXPECT_TRUE(tells(warned.err, "give --shift " + shifts[index] + "\n")) << warned.err;
+    words.insert(words.end(), shifts.begin(), shifts.end());
+    const Outcome parted = runCadrel(words);
+
+    EXPECT_EQ(parted.status, 0);
+    EXPECT_EQ(parted.err, "");
 }
 
 TEST(Shift, MovesTheTimecodesOfItsFileAloneInEveryCommand)

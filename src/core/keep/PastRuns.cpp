@@ -25,16 +25,8 @@ namespace {
 /// The stretches of a change EDL, in order; those that go on alike are one.
 std::vector<ChangeStretch> stretchesOf(const EventList& changes, const Framerate& framerate)
 {
-    std::vector<ChangeStretch> all;
-    for (const auto& event : changes.events()) {
-        if (const auto stretch = changeStretchOf(*event, framerate))
-            all.push_back(*stretch);
-    }
-    std::stable_sort(all.begin(), all.end(), [](const ChangeStretch& a, const ChangeStretch& b) {
-        return a.destination.start < b.destination.start;
-    });
     std::vector<ChangeStretch> joined;
-    for (const ChangeStretch& stretch : all) {
+    for (const ChangeStretch& stretch : unhealedStretches(changes, framerate)) {
         const bool goesOn = !joined.empty() && joined.back().shift == stretch.shift &&
                             joined.back().destination.end == stretch.destination.start;
         if (goesOn)
