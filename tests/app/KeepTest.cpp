@@ -2,13 +2,11 @@
 
 // What the picture didn't change stays: the laws of a run through the whole program.
 
-#include "standin/changes/ChangeLog.h"
-#include "standin/file/ProjectFile.h"
 #include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
+#include "tests/app/StoredProjects.h"
 #include "tests/support/TreePaths.h"
 #include "tests/support/core/TreeEdls.h"
-#include "tests/support/standin/RandomProject.h"
 
 #include <algorithm>
 #include <array>
@@ -103,20 +101,6 @@ bool tells(const std::string& text, const std::string& piece)
     return text.find(piece) != std::string::npos;
 }
 
-json tracksIn(const std::filesystem::path& project)
-{
-    return json::parse(contentOf(project)).at("tracks");
-}
-
-json trackIn(const std::filesystem::path& project, const std::string& name)
-{
-    for (const json& track : tracksIn(project)) {
-        if (track.at("name") == name)
-            return track;
-    }
-    return {};
-}
-
 /// "name start-end" of what lies on a track.
 Words placesOn(const std::string& track, const std::filesystem::path& project)
 {
@@ -179,17 +163,6 @@ json soundOfThreeShots()
                                            clip("tail", Hour + 31, Hour + 33)})});
 }
 
-std::string randomText(std::uint64_t seed, const cadrel::core::Framerate& framerate)
-{
-    standin::ChangeLog log;
-    standin::tests::SeededChance chance(seed);
-    json project = json::parse(standin::ProjectFile::toText(*standin::tests::randomProject(chance, log)));
-    project["framesPerSecond"] = framerate.framesPerSecond;
-    project["dropFrame"] = framerate.dropFrame == 1;
-    project["pulledDown"] = framerate.pulledDown;
-    return project.dump();
-}
-
 TEST(Keep, EveryEdlOfTheTreeOntoItselfChangesNoTrackOfAnyProject)
 {
     const TempFolder folder;
@@ -200,7 +173,7 @@ TEST(Keep, EveryEdlOfTheTreeOntoItselfChangesNoTrackOfAnyProject)
         const TreeEdl edl(path);
         if (!edl.events().hasReadableEvent())
             continue;
-        const auto project = folder.write("random.stage", randomText(seed++, edl.framerate()));
+        const auto project = folder.write("random.stage", randomProjectText(seed++, edl.framerate()));
         const auto result = folder / "result.stage";
 
         const Outcome outcome = runCadrel({"apply", project, "--old", treePath(path), "--new", treePath(path),
@@ -224,7 +197,7 @@ TEST(Keep, ACutOntoItselfStoresTheModelAlone)
     for (std::uint64_t seed = 100; seed < 130; ++seed) {
         SCOPED_TRACE(seed);
         const Job job(threeShots(), threeShots(), json::array());
-        writeFile(job.project, randomText(seed, cadrel::core::Framerate(24, 0)));
+        writeFile(job.project, randomProjectText(seed, cadrel::core::Framerate(24, 0)));
 
         const Outcome outcome = job.run({"--force"});
 
@@ -233,25 +206,6 @@ TEST(Keep, ACutOntoItselfStoresTheModelAlone)
         EXPECT_EQ(tracksIn(job.result), tracksIn(job.project));
         EXPECT_NE(contentOf(job.result), contentOf(job.project));
     }
-}
-
-/// The value of a curve at a time, straight between its points.
-double valueAt(const json& points, double time)
-{
-    const json* before = nullptr;
-    for (const json& point : points) {
-        const double at = point.at("time");
-        if (at >= time) {
-            if (!before)
-                return point.at("value");
-            const double from = before->at("time");
-            const double share = at > from ? (time - from) / (at - from) : 1.0;
-            return before->at("value").get<double>() +
-                   share * (point.at("value").get<double>() - before->at("value").get<double>());
-        }
-        before = &point;
-    }
-    return before ? before->at("value").get<double>() : 0.0;
 }
 
 TEST(Keep, BeforeOneChangeNothingMovesAndAfterItEverythingByTheSame)
@@ -408,45 +362,6 @@ TEST(Keep, ACurveThatGoesOnBeyondTheChangeHasNoStrayPoints)
     }
 }
 
-/// The tracks of a project whose content a run may change, those in folders too; without those that runs write on.
-std::vector<json> changeableTracks(const json& tracks)
-{
-    std::vector<json> found;
-    for (const json& track : tracks) {
-        if (track.at("kind") == "folder") {
-            for (const json& inner : changeableTracks(track.value("tracks", json::array())))
-                found.push_back(inner);
-        } else if (track.at("kind") != "ruler" && track.value("name", std::string()) != "Destination" &&
-                   track.value("name", std::string()) != "Insert") {
-            found.push_back(track);
-        }
-    }
-    return found;
-}
-
-double endOf(const json& event)
-{
-    return event.value("end", event.at("start").get<double>());
-}
-
-/// Whether a list holds the event, as much later as `shift`; 0 means to the last bit.
-bool holds(const json& events, const json& event, double shift)
-{
-    const auto isSame = [&](const json& other) {
-        if (shift == 0.0)
-            return other == event;
-        json moved = other;
-        moved["start"] = event.at("start");
-        if (event.contains("end"))
-            moved["end"] = event.at("end");
-        constexpr double SameInstant = 1.0 / 384000;
-        return moved == event &&
-               std::abs(other.at("start").get<double>() - event.at("start").get<double>() - shift) < SameInstant &&
-               std::abs(endOf(other) - endOf(event) - shift) < SameInstant;
-    };
-    return std::any_of(events.begin(), events.end(), isSame);
-}
-
 TEST(Keep, InRandomProjectsOneChangeLeavesWhatIsBeforeItAndShiftsWhatIsAfter)
 {
     constexpr double Change = 40;
@@ -458,7 +373,7 @@ TEST(Keep, InRandomProjectsOneChangeLeavesWhatIsBeforeItAndShiftsWhatIsAfter)
     for (std::uint64_t seed = 200; seed < 320; ++seed) {
         SCOPED_TRACE(seed);
         const Job job(before, after, json::array());
-        json project = json::parse(randomText(seed, cadrel::core::Framerate(24, 0)));
+        json project = json::parse(randomProjectText(seed, cadrel::core::Framerate(24, 0)));
         project["timeOrigin"] = Hour;
         writeFile(job.project, project.dump());
 
