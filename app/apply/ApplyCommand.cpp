@@ -22,11 +22,13 @@
 #include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
+#include "core/keep/PastRuns.h"
 #include "core/model/DataModel.h"
 #include "core/time/SecondsRange.h"
 #include "core/time/Timecode.h"
 #include "standin/base/Times.h"
 #include "standin/project/Project.h"
+#include "util/Result.h"
 
 #include <algorithm>
 #include <chrono>
@@ -286,6 +288,28 @@ FrameRanges sourcesOf(const DataModel& model, const KeptRun* kept)
     return sources;
 }
 
+/// The runs that the project has behind it; the lists of the model tell of the last.
+core::PastRuns pastRunsOf(const DataModel& model)
+{
+    const Settings& settings = model.settings();
+    core::PastRuns runs({settings.matchBy(), settings.vfxPatterns(), Timecode::framerate()});
+    core::Variant stored;
+    if (model.getProperty(core::PropertyKey::EarlierRuns, stored) == util::Result::Ok)
+        runs.read(stored.toText());
+    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl());
+    return runs;
+}
+
+/// Lets the project keep of the runs behind it what that of the model's lists leaves.
+void remember(core::PastRuns& runs, DataModel& model)
+{
+    runs.forgetHiddenBy(model.oldEdl(), model.newEdl(), model.changeEdl());
+    if (runs.isEmpty())
+        model.removeProperty(core::PropertyKey::EarlierRuns);
+    else
+        model.setProperty(core::PropertyKey::EarlierRuns, core::Variant(runs.toBytes()));
+}
+
 /// What the run is going to be, and what is known of it before.
 class Preparation {
 public:
@@ -294,8 +318,7 @@ public:
         : m_hosted(hosted), m_clock(clock), m_options(options), m_edls(edlsOf(options)), m_facts(hosted.model())
     {
         DataModel& model = hosted.model();
-        EventList lastCut;
-        lastCut.append(model.newEdl().release());
+        core::PastRuns runs = pastRunsOf(model);
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
@@ -305,7 +328,9 @@ public:
         m_facts.jsonFile = JsonOutput::isFile(options.jsonFile) ? options.jsonFile : std::string();
         const Plausibility plausibility(model, options.projectFile, m_edls);
         if (source.cuts)
-            checkCuts(plausibility, lastCut, terminal);
+            checkCuts(plausibility, runs, terminal);
+        require(plausibility.doubtOfChanges(runs, !source.cuts), options);
+        remember(runs, model);
         plan(source.cuts.has_value());
         if (source.cuts) {
             require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options);
@@ -320,9 +345,9 @@ public:
 private:
     bool isPlanned(const ChangeSource& source) const { return m_kept && source.cuts; }
 
-    void checkCuts(const Plausibility& plausibility, const EventList& lastCut, Terminal& terminal)
+    void checkCuts(const Plausibility& plausibility, const core::PastRuns& runs, Terminal& terminal)
     {
-        require(plausibility.doubtOfLastCut(lastCut), m_options);
+        require(plausibility.doubtOfLastCut(runs), m_options);
         require(plausibility.doubtOfNames(), m_options);
         require(plausibility.doubtOfSound(m_hosted.project()), m_options);
         if (const auto dull = plausibility.dullNames()) {
@@ -345,6 +370,7 @@ private:
         m_kept.emplace(model, m_hosted.project(), m_clock,
                        isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_options.isForced, m_edls);
         m_facts.isRunNeeded = m_kept->needsRun();
+        m_facts.isHeldBack = m_kept->plan().isHeldBack;
         const Framerate framerate = Timecode::framerate();
         for (const core::FrameRange& range : m_kept->plan().lost)
             m_facts.lost.push_back({range.start / framerate.rate, range.end / framerate.rate});

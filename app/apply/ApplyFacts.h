@@ -43,6 +43,7 @@ struct ApplyFacts {
     std::vector<PassedOver> passedOver;
     std::size_t appliedCount = 0;
     bool isRunNeeded = true; ///< false: the project is as the new cut needs it
+    bool isHeldBack = false; ///< all that would change stands where the user lets nothing change
     /// For each event of the change list where its stretches are from; empty where all are from the cut.
     std::vector<core::KeptEvent> kept;
     std::vector<core::SecondsRange> lost; ///< what goes although no picture stands there; by the project's clock

@@ -162,6 +162,8 @@ void ApplyListing::printTotals(std::ostream& out) const
     if (m_facts.isRunNeeded)
         out << "Applied     " << counted(m_facts.appliedCount, "event") << " in " << secondsText(m_facts.seconds)
             << '\n';
+    else if (m_facts.isHeldBack)
+        out << "Applied     nothing, since all that would change lies outside of the stretch that may change\n";
     else
         out << "Applied     nothing, since no track has to change\n";
     printPassedOver(out);
@@ -184,8 +186,9 @@ void ApplyListing::printLost(std::ostream& out) const
 {
     const auto timeText = [this](double seconds) { return m_clock.timecode(seconds - m_facts.timeOrigin); };
     const char* title = "Lost        ";
+    const char* const why = m_facts.generation ? ", for want of room\n" : ", which the change EDL carries nowhere\n";
     for (const core::SecondsRange& range : m_facts.lost) {
-        out << title << timeText(range.start) << " - " << timeText(range.end) << ", for want of room\n";
+        out << title << timeText(range.start) << " - " << timeText(range.end) << why;
         title = "            ";
     }
 }

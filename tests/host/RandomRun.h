@@ -146,8 +146,9 @@ public:
         bool isBefore;
     };
     /// Where the automation of an instant comes from that no event covers: the end of the stretch before it or, before the
-    /// first one, the start of that. Nothing without stretches.
-    std::optional<Side> heldFrom(double time) const
+    /// first one, the start of that; what stands before the range to which the run is restricted. Nothing without
+    /// stretches.
+    std::optional<Side> heldFrom(double time)
     {
         std::optional<double> end;
         std::optional<double> first;
@@ -159,6 +160,9 @@ public:
                 end = std::max(end.value_or(out), out);
             first = std::min(first.value_or(carried.destination), carried.destination);
         }
+        const double range = std::max(model().settings().preserveMaterialBefore() - project.timeOrigin(), 0.0);
+        if (isRestricted() && isReplaced(time) && (!end || *end <= range))
+            return Side{range, true};
         if (!first)
             return std::nullopt;
         constexpr double Hair = 1e-6;

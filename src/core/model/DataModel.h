@@ -40,6 +40,7 @@ struct PropertyKey {
         NewTableSelection = 10018,      ///< string, likewise
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
+        EarlierRuns = 10022,            ///< string, the bytes of PastRuns without the run that the lists tell of
     };
 };
 

@@ -128,6 +128,13 @@ GapTracks gapTracksOf(const std::vector<Track>& tracks, const core::CutList& cut
     return found;
 }
 
+/// What of `range` none of the ranges covers, which are in order and don't touch.
+std::vector<SecondsRange> gapsBetween(const std::vector<SecondsRange>& ranges, const SecondsRange& range)
+{
+    std::vector<SecondsRange> covered = ranges;
+    return cover(covered, range);
+}
+
 std::vector<const Track*> pointersTo(const std::vector<Track>& tracks)
 {
     std::vector<const Track*> pointers;
@@ -229,29 +236,39 @@ void Project::generateMarkers(IEditTransaction& transaction, const std::vector<c
 //     cuts      |     |-- fade --|     |-- 1 --|-- 2 --|       |
 //     before     _____|``--..____|_____|```````|--..___|_______       what the curve has come to at the end of the reel
 //     after      `````|``--..____|_____|```````|--..___|_______
+//
+// Before the first cut of a whole programme there is nothing to keep. Before a part of one there is.
 void Project::holdAutomation(IEditTransaction& transaction, const core::CutList& cuts, bool isWholeProgramme)
 {
     const double offset = requiredOffset();
+    const bool isPart = isWholeProgramme && m_model.settings().restrictRange();
     m_indexes.clear();
     double start = 0.0;
     double end = 0.0;
     getApplyRange(start, end);
+    start = std::max(start, 0.0);
+    const double previewEnd = std::min(end, offset - ClearedMargin);
+    // A preview shows what lies beyond the range too.
+    end = isPart ? end : offset;
     for (auto& [node, track] : gapTracksOf(automatedTracks(), cuts)) {
         const std::vector<SecondsRange>& written = track.done;
-        if (written.empty())
-            continue;
+        const std::vector<SecondsRange> gaps =
+            isPart || !written.empty() ? gapsBetween(written, {start, end}) : std::vector<SecondsRange>();
         for (AutomationCurve& curve : track.curves) {
-            curve.holdBackwards(m_hostContext, transaction, std::max(start, 0.0) + offset,
-                                written.front().start + offset);
-            for (std::size_t i = 1; i < written.size(); ++i)
-                curve.hold(m_hostContext, transaction, written[i - 1].end + offset, written[i].start + offset);
-            const double last = written.back().end + offset;
-            if (!isWholeProgramme)
-                curve.hold(m_hostContext, transaction, last, std::min(end, offset - ClearedMargin) + offset);
-            else if (m_model.settings().restrictRange())
-                curve.hold(m_hostContext, transaction, last, end + offset);
-            else
-                curve.holdLast(m_hostContext, transaction, last, end + offset);
+            for (const SecondsRange& gap : gaps) {
+                const bool isFirst = !isBefore(start, gap.start);
+                const bool isLast = !isBefore(gap.end, end);
+                if (isFirst && isPart)
+                    curve.holdAsAt(start, m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else if (isFirst)
+                    curve.holdBackwards(m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else if (!isLast || isPart)
+                    curve.hold(m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else if (isWholeProgramme)
+                    curve.holdLast(m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else
+                    curve.hold(m_hostContext, transaction, gap.start + offset, previewEnd + offset);
+            }
         }
     }
 }

@@ -1027,11 +1027,7 @@ TEST_P(ProjectVirginTerritoryTest, ARestrictedRunHoldsTheAutomationInItsRange)
     listCuts({{"01:00:10:00", "01:00:20:00"}});
 
     hold();
-    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
 
-    settings().setPreserveMaterial(3635.0, 3640.0);
-    listCuts({{"01:00:40:00", "01:00:50:00"}});
-    hold();
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
 }
 
@@ -1045,6 +1041,35 @@ TEST_P(ProjectVirginTerritoryTest, ACutIsAsLongAsItsMaterial)
 
     // From 20 s on there is nothing, though the first one is to last longer.
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, ARestrictedRunKeepsWhatThereIsBeforeItsRange)
+{
+    // The programme itself has 0.2 up to 15 s, where the preview has 0.8 from 25 s on.
+    settings().setRestrictRange(true);
+    settings().setPreserveMaterial(3626.0, 3640.0);
+    listCuts({{"01:00:30:00", "01:00:40:00"}});
+
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 26.0, 26.0, 30.0, 30.0, 35.0, 45.0}));
+
+    // Nothing of a cut before the range comes into the programme.
+    listCuts({{"01:00:10:00", "01:00:24:00"}, {"01:00:30:00", "01:00:40:00"}});
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 26.0, 26.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, ARestrictedRunWithoutCutsKeepsWhatThereIsBeforeItsRange)
+{
+    settings().setRestrictRange(true);
+    settings().setPreserveMaterial(3630.0, 3640.0);
+    cuts.clear();
+
+    hold(false);
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 35.0, 45.0}));
+
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 30.0, 30.0, 40.0, 40.0, 45.0}));
 }
 
 TEST_P(ProjectVirginTerritoryTest, OfLockedAndUnselectedTracksNoAutomationIsHeld)
