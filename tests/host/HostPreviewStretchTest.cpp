@@ -368,27 +368,6 @@ TEST_P(HostPreviewStretchTest, LeavesAMemoThatTheUserHasWrittenWhereTheNewCutHas
     EXPECT_EQ(host.contentOf(memos), (Texts{"too loud 2-2", "click 6-6", "needs sound 86404-86404"}));
 }
 
-TEST_P(HostPreviewStretchTest, LetsNoMemoFollowOnceTheTimeOriginHasMoved)
-{
-    const Node memos = host.addTrack(TypeWord::Marker, u"Memos");
-    memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
-    host.addPointMarker(memos, u"click", host.inHost(6.0));
-    host.addPointMarker(memos, u"pop", host.inHost(12.0));
-    previewAll();
-    host.idle();
-    const auto copies = standin::tests::childrenOf(*memos);
-    ASSERT_EQ(copies.size(), 4U);
-    const auto starts = [&] { return std::pair(copies[0]->getStart(nullptr), copies[1]->getStart(nullptr)); };
-    const auto before = starts();
-    host.project.setTimeOrigin(host.origin + 5.0);
-    host.idle();
-
-    host.edit(u"Move", [&] { copies[2]->setStart(nullptr, 0, copies[2]->getStart(nullptr) + 1.0); });
-
-    EXPECT_EQ(starts(), before);
-    EXPECT_EQ(standin::tests::childrenOf(*memos).size(), 4U);
-}
-
 // Locks.
 
 TEST_P(HostPreviewStretchTest, LocksItsTracksAgainWhenItsEmptyingIsUndone)
