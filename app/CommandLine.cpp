@@ -3,7 +3,8 @@
 #include "app/CommandLine.h"
 
 #include "app/console/Failure.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
+#include "app/console/Replacing.h"
 #include "app/edl/ProjectFramerate.h"
 #include "app/settings/SettingsTable.h"
 #include "core/settings/Settings.h"
@@ -126,6 +127,14 @@ std::string isNamed(const std::string& name)
 void addOutput(CLI::App& command, const char* name, std::string& file, const char* help)
 {
     command.add_option(name, file, help)->check(isNamed)->type_name("FILE");
+}
+
+/// The file that the command is for.
+void addResult(CLI::App& command, std::string& file, Replacing& replacing, const char* help)
+{
+    addOutput(command, "-o,--output", file, help);
+    command.add_flag("--overwrite", replacing.isAllowed, "Replace the file of -o where it exists");
+    command.add_flag("--backup", replacing.keepsFormer, "Keep what is replaced, as NAME_backup_1 and so on");
 }
 
 CLI::Option* addFiles(CLI::App& command, const char* name, std::vector<std::string>& files, const char* help)
@@ -287,7 +296,7 @@ CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
     CLI::App* const generate = program.add_subcommand("generate", "Make the change EDL from an old and a new cut");
     addFiles(*generate, "--old", options.generation.oldFiles, "EDLs of the old cut, in order")->required();
     addFiles(*generate, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
-    addOutput(*generate, "-o,--output", options.changeFile, "Where to write the change EDL");
+    addResult(*generate, options.changeFile, options.replacing, "Where to write the change EDL");
     addOutput(*generate, "--json", options.jsonFile, EventsJsonHelp);
     addMatching(*generate, options.generation.settings);
     addShift(*generate, options.generation.shifts);
@@ -309,7 +318,7 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
         addFiles(*apply, "--change", options.changeFiles, "A change EDL instead, in one file or several")
             ->excludes(oldFiles)
             ->excludes(newFiles);
-    addOutput(*apply, "-o,--output", options.outputFile, "Where to write the project");
+    addResult(*apply, options.outputFile, options.replacing, "Where to write the project");
     apply->add_flag("--in-place", options.inPlace, "Replace the project itself")->excludes("--output");
     addOutput(*apply, "--json", options.jsonFile, AllJsonHelp);
     apply->add_flag("--summary", options.summary, "Print the totals alone");
@@ -341,7 +350,8 @@ CLI::App* addNotes(CLI::App& program, NotesOptions& options)
     CLI::App* const notes = program.add_subcommand("notes", "Tell what has changed between two cuts, step by step");
     addFiles(*notes, "--old", options.generation.oldFiles, "EDLs of the old cut, in order")->required();
     addFiles(*notes, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
-    addOutput(*notes, "-o,--output", options.outputFile, "Where to write the notes: .html, .pdf, .csv, .txt or .json");
+    addResult(*notes, options.outputFile, options.replacing,
+              "Where to write the notes: .html, .pdf, .csv, .txt or .json");
     notes
         ->add_option("--simplify", options.simplify,
                      "Join trims that cancel out within so many frames into one step (default 0, none)")

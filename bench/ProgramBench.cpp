@@ -94,7 +94,7 @@ double slowestNotes(const std::string& program, const std::filesystem::path& fol
         std::array<double, Runs> seconds{};
         for (double& run : seconds)
             run = measure({program, "notes", "--old", stem + "_old.edl", "--new", stem + "_new.edl", "-o",
-                           stem + extension})
+                           stem + extension, "--overwrite"})
                       .seconds;
         slowest = std::max(slowest, median(seconds));
     }
@@ -108,7 +108,8 @@ std::vector<std::string> generateCommand(const std::string& program, const std::
     const Cut oldCut = makeCut(shotCount);
     writeEdl(stem + "_old.edl", oldCut);
     writeEdl(stem + "_new.edl", recut(oldCut, shotCount / 100));
-    return {program, "generate", "--old", stem + "_old.edl", "--new", stem + "_new.edl", "-o", stem + "_change.edl"};
+    return {program, "generate",           "--old",      stem + "_old.edl", "--new", stem + "_new.edl",
+            "-o",    stem + "_change.edl", "--overwrite"};
 }
 
 /// A project whose one track has so many clips, each half as long as all of them together.
@@ -138,8 +139,8 @@ std::vector<std::string> applyCommand(const std::string& program, const std::fil
     writeEdl(stem + "_old.edl", oldCut);
     writeEdl(stem + "_new.edl", recut(oldCut, 4));
     writeStackedProject(stem + ".stage", clipCount);
-    return {program,           "apply", stem + ".stage",     "--old",    stem + "_old.edl", "--new",
-            stem + "_new.edl", "-o",    stem + "_new.stage", "--summary"};
+    return {program,           "apply", stem + ".stage",     "--old",       stem + "_old.edl", "--new",
+            stem + "_new.edl", "-o",    stem + "_new.stage", "--overwrite", "--summary"};
 }
 
 bool run(const std::string& program, const std::filesystem::path& folder)

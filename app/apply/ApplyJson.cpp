@@ -68,6 +68,7 @@ ordered_json ApplyJson::toJson() const
     json["tracks"] = std::move(tracks);
     json["markers"] = std::move(markers);
     json["written"] = m_facts.written.empty() ? ordered_json() : ordered_json(m_facts.written);
+    json["backup"] = m_facts.backups.empty() ? ordered_json() : ordered_json(m_facts.backups.front());
     return json;
 }
 

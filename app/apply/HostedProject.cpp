@@ -18,6 +18,7 @@
 
 namespace cadrel::app {
 
+using standin::ProjectFileChanged;
 using standin::ProjectFileError;
 using util::Result;
 
@@ -70,7 +71,8 @@ private:
 } // namespace
 
 HostedProject::HostedProject(const std::string& file, const Terminal& terminal)
-    : m_file(file), m_application(standin::Terminal(std::cerr, terminal.showsProgress(), Interruption::request())),
+    : m_file(file), m_stamp(util::FileStamp::of(file)),
+      m_application(standin::Terminal(std::cerr, terminal.showsProgress(), Interruption::request())),
       m_host(Velmark::makeCounted<host::Host>(m_application.context()))
 {
     requireReadableProject(file);
@@ -107,10 +109,12 @@ void HostedProject::apply()
         throw breakFailure(end.result(), m_file);
 }
 
-void HostedProject::save(const std::string& file)
+void HostedProject::save(const std::string& file, const std::optional<util::FileStamp>& expected)
 {
     try {
-        m_application.saveProject(*m_project, file);
+        m_application.saveProject(*m_project, file, expected);
+    } catch (const ProjectFileChanged& error) {
+        throw changedFailure(error, file);
     } catch (const ProjectFileError& error) {
         throw writingFailure(error, file);
     }

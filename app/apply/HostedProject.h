@@ -3,8 +3,10 @@
 #pragma once
 
 #include "standin/Application.h"
+#include "util/FileStamp.h"
 #include "velmark/Counted.h"
 
+#include <optional>
 #include <string>
 
 namespace cadrel::core {
@@ -38,11 +40,20 @@ public:
     /// Interruption::Requested then, and Failure when the run couldn't begin or failed.
     void apply();
 
-    /// The host's own save, in which the model is stored with the project. Throws Failure.
-    void save(const std::string& file);
+    // The host's own save, in which the model is stored with the project. Each throws Failure, with all files as they were.
+
+    /// Over the file that was read. Refused when another program has saved it since.
+    void saveInPlace() { save(m_file, m_stamp); }
+    /// To a file that doesn't exist. Refused when it does by now.
+    void saveAs(const std::string& file) { save(file, util::FileStamp()); }
+    /// Over whatever stands there.
+    void saveOver(const std::string& file) { save(file, std::nullopt); }
 
 private:
+    void save(const std::string& file, const std::optional<util::FileStamp>& expected);
+
     std::string m_file;
+    util::FileStamp m_stamp; ///< of the file, before it was read
     standin::Application m_application;
     Velmark::Counted<host::Host> m_host;
     standin::Project* m_project = nullptr;

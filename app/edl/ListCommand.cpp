@@ -4,7 +4,7 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
@@ -90,20 +90,19 @@ void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const 
     for (const LoadedEdl& edl : edls)
         names.push_back(fileNameOf(edl.path));
     std::optional<Interruption> interruption;
-    if (!JsonOutput::isStandardOutput(path))
+    if (!Output::isStandardOutput(path))
         interruption.emplace();
-    JsonOutput json(path);
+    Output json(path);
     EventJson::write(allEvents(edls), {{"files", names}, {"rate", rate}},
                      [&json](std::string_view text) { json.write(text); });
-    json.finish();
-    json.keep();
+    json.place();
 }
 
 } // namespace
 
 void runList(const ListOptions& options, Terminal& terminal)
 {
-    const bool jsonOnly = JsonOutput::isStandardOutput(options.jsonFile);
+    const bool jsonOnly = Output::isStandardOutput(options.jsonFile);
     if (!options.jsonFile.empty() && !jsonOnly)
         refuseToOverwrite(options.files, options.jsonFile);
     LoadOptions load = options.load;

@@ -4,7 +4,7 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Printable.h"
 #include "app/console/Terminal.h"
@@ -91,14 +91,13 @@ Tracks tracksNamed(Project& project, const ShowOptions& options)
 void writeJson(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
 {
     std::optional<Interruption> interruption;
-    if (!JsonOutput::isStandardOutput(options.jsonFile))
+    if (!Output::isStandardOutput(options.jsonFile))
         interruption.emplace();
-    JsonOutput json(options.jsonFile);
+    Output json(options.jsonFile);
     ProjectJson(project, clock, [&json](std::string_view text) {
         json.write(text);
     }).write(fileNameOf(options.projectFile), tracks);
-    json.finish();
-    json.keep();
+    json.place();
 }
 
 void print(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
@@ -125,7 +124,7 @@ void print(Project& project, const ProjectClock& clock, const Tracks& tracks, co
 
 void runShow(const ShowOptions& options, Terminal& terminal)
 {
-    const bool jsonOnly = JsonOutput::isStandardOutput(options.jsonFile);
+    const bool jsonOnly = Output::isStandardOutput(options.jsonFile);
     if (!options.jsonFile.empty() && !jsonOnly)
         refuseToOverwrite({options.projectFile}, options.jsonFile);
     Project& project = read(options.projectFile, terminal);

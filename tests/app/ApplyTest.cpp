@@ -604,7 +604,7 @@ TEST(Apply, VirginTerritoriesLeadTheAutomationOverWhatHasNoOldSound)
         const Scene scene(origin);
         const auto result = scene.folder / "result.stage";
         const auto volumeWith = [&](const std::string& option) {
-            EXPECT_EQ(scene.apply({"-o", result, option}).status, 0);
+            EXPECT_EQ(scene.apply({"-o", result, "--overwrite", option}).status, 0);
             const json shown = show(result);
             Words points;
             for (const json& point : named(shown.at("tracks"), "DIA").at("automation").at(0).at("points"))
@@ -650,7 +650,7 @@ TEST(Apply, AFadeAtTheEndOfTheReelIsHeardInNoInsert)
     const auto oldFile = folder.write("old.edl", oldCut());
     const auto applied = [&](const std::string& newFile) {
         const Outcome outcome = runCadrel({"apply", project, "--old", oldFile, "--new", newFile, "--keep", "cut",
-                                           "--force", "-o", result, "--json", "-"});
+                                           "--force", "-o", result, "--overwrite", "--json", "-"});
         EXPECT_EQ(outcome.status, 0) << outcome.err;
         return json::parse(outcome.out);
     };
@@ -1066,6 +1066,104 @@ TEST(Apply, AnInterruptionTakesTheRunBackAndLeavesTheFilesAsTheyWere)
     EXPECT_EQ(contentOf(scene.project), before);
     EXPECT_EQ(contentOf(document), "former report");
     EXPECT_EQ(scene.folder.names(), (Words{"long.stage", "new.edl", "old.edl", "report.json"}));
+}
+
+TEST(Apply, WhatAnotherProgramSavesDuringTheRunIsNotOverwritten)
+{
+    const LongScene scene;
+    const std::string document = scene.folder / "report.json";
+    const auto run = [&](const Words& options) {
+        return runCadrelDisturbedAt("Processing Project", scene.arguments(options), [&] {
+            scene.folder.write("other", "of another program");
+            std::filesystem::rename(scene.folder / "other", scene.project);
+        });
+    };
+    const std::string project = contentOf(scene.project);
+    const std::string message =
+        ": another program has written it meanwhile; look at what it has written, and run again";
+
+    const Outcome outcome = run({"--in-place", "--backup", "--json", document});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(tells(outcome.out, scene.project + message)) << outcome.out;
+    EXPECT_EQ(contentOf(scene.project), "of another program");
+    EXPECT_EQ(scene.folder.names(), (Words{"long.stage", "new.edl", "old.edl"}));
+
+    // Beside it there is nothing to lose.
+    writeFile(scene.project, project);
+    EXPECT_EQ(run({"-o", scene.folder / "result.stage", "--summary"}).status, 0);
+}
+
+TEST(Apply, AFileThatComesUpDuringTheRunIsNotOverwritten)
+{
+    const LongScene scene;
+    const std::string result = scene.folder / "result.stage";
+    const auto run = [&](const Words& options) {
+        return runCadrelDisturbedAt("Processing Project", scene.arguments(options),
+                                    [&] { writeFile(result, "of another program"); });
+    };
+
+    const Outcome outcome = run({"-o", result, "--summary"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(tells(outcome.out, result + ": another program has written it meanwhile")) << outcome.out;
+    EXPECT_EQ(contentOf(result), "of another program");
+    EXPECT_EQ(run({"-o", result, "--overwrite", "--summary"}).status, 0);
+    EXPECT_NE(contentOf(result), "of another program");
+}
+
+TEST(Apply, AProjectThatExistsIsReplacedOnlyWhenThatIsSaid)
+{
+    const Scene scene;
+    const std::string result = scene.folder.write("result.stage", "former");
+
+    const Outcome outcome = scene.apply({"-o", result});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err, "cadrel: " + result + ": exists already; give --overwrite to replace it, or another name\n");
+    EXPECT_EQ(contentOf(result), "former");
+    EXPECT_EQ(scene.apply({"-o", result, "--overwrite"}).status, 0);
+    EXPECT_EQ(placesOn("Guide", result), (Places{{"guide", {"0-30"}}}));
+    EXPECT_EQ(scene.folder.names(), (Words{"new.edl", "old.edl", "result.stage", "scene.stage"}));
+}
+
+TEST(Apply, ABackupKeepsWhatIsReplacedUnderTheFirstFreeNumber)
+{
+    const Scene scene;
+    const std::string before = contentOf(scene.project);
+    const std::string first = scene.folder / "scene_backup_1.stage";
+    const std::string second = scene.folder / "scene_backup_2.stage";
+
+    const Outcome outcome = scene.apply({"--in-place", "--backup", "--summary"});
+
+    EXPECT_TRUE(outcome.out.ends_with("Written     " + scene.project + "\nBackup      " + first + "\n")) << outcome.out;
+    EXPECT_EQ(contentOf(first), before);
+    const std::string after = contentOf(scene.project);
+    EXPECT_NE(after, before);
+
+    std::filesystem::create_symlink("scene.stage", scene.folder / "link.stage");
+    const Outcome again = runCadrel({"apply", scene.folder / "link.stage", "--old", scene.oldFile, "--new",
+                                     scene.newFile, "--in-place", "--backup", "--force", "--json", "-"});
+
+    EXPECT_EQ(json::parse(again.out).at("backup"), second);
+    EXPECT_EQ(contentOf(first), before);
+    EXPECT_EQ(contentOf(second), after);
+    EXPECT_TRUE(std::filesystem::is_symlink(scene.folder / "link.stage"));
+    EXPECT_EQ(scene.applyAsJson({"--force", "--backup"}).at("backup"), json());
+    EXPECT_EQ(scene.folder.names(), (Words{"link.stage", "new.edl", "old.edl", "scene.stage", "scene_backup_1.stage",
+                                           "scene_backup_2.stage"}));
+}
+
+TEST(Apply, NothingIsPrintedOfAProjectThatCantBeWritten)
+{
+    const Scene scene;
+
+    const Outcome outcome = scene.apply({"-o", "/dev/full", "--json", "-"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err, "cadrel: /dev/full: can't be written; see whether the disk is full\n");
 }
 
 TEST(Apply, TheSoundOfAReelGoesOverToItsNewCut)

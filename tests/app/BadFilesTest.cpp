@@ -213,8 +213,8 @@ void expectUnwritable(const std::string& path, const std::string& problem, const
         return run(arguments);
     };
 
-    expectStopped(with({"-o", path}), path + ": " + problem);
-    expectStopped(with({"-o", path, "--json", folder / "change.json"}), path + ": " + problem);
+    expectStopped(with({"-o", path, "--overwrite"}), path + ": " + problem);
+    expectStopped(with({"-o", path, "--overwrite", "--json", folder / "change.json"}), path + ": " + problem);
     expectStopped(with({"-o", folder / "change.edl", "--json", path}), path + ": " + problem);
     expectStopped(run({"list", oldFile, "--json", path}), path + ": " + problem);
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
@@ -326,8 +326,10 @@ TEST(BadOutput, AFormerFileStaysWhenTheRunFails)
     const std::string change = folder.write("change.edl", "former list");
     const std::string document = folder.write("change.json", "former document");
 
-    EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", change, "--json", "/dev/full"}).status,
-              1);
+    EXPECT_EQ(
+        runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", change, "--overwrite", "--json", "/dev/full"})
+            .status,
+        1);
     EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", "/dev/full", "--json", document}).status,
               1);
 
@@ -349,7 +351,8 @@ TEST(BadOutput, StandardOutputThatTakesNothing)
         runCadrel({"generate", "--old", oldFile, "--new", oldFile, "-o", folder / "change.edl", "--json", "-"},
                   "/dev/full"),
         line);
-    EXPECT_EQ(folder.names(), (std::vector<std::string>{"old.edl"}));
+    // Printing comes last, and what is completely written by then stays.
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.edl", "old.edl"}));
 }
 
 TEST(BadOutput, AFileCompletelyWrittenStaysWhenTheSummaryCantBeShown)
@@ -362,6 +365,46 @@ TEST(BadOutput, AFileCompletelyWrittenStaysWhenTheSummaryCantBeShown)
 
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.edl", "old.edl"}));
+}
+
+TEST(BadOutput, NothingIsPrintedOfAListThatCantBeWritten)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+
+    const Outcome outcome =
+        runCadrel({"generate", "--old", oldFile, "--new", oldFile, "-o", "/dev/full", "--json", "-"});
+
+    expectStopped(outcome, "/dev/full: can't be written; see whether the disk is full");
+}
+
+TEST(BadOutput, AFileThatExistsIsReplacedOnlyWhenThatIsSaid)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    for (const std::string command : {"generate", "notes"}) {
+        const std::string file = folder.write("result.txt", "former");
+        const std::vector<std::string> arguments{command, "--old", oldFile, "--new", newFile, "-o", file};
+
+        expectStopped(runCadrel(arguments), file + ": exists already; give --overwrite to replace it, or another name");
+        EXPECT_EQ(contentOf(file), "former");
+
+        std::vector<std::string> replacing = arguments;
+        replacing.emplace_back("--overwrite");
+        EXPECT_EQ(runCadrel(replacing).status, 0);
+        const std::string result = contentOf(file);
+        EXPECT_NE(result, "former");
+
+        replacing.emplace_back("--backup");
+        folder.write("result.txt", "former");
+        EXPECT_EQ(runCadrel(replacing).status, 0);
+        EXPECT_EQ(contentOf(file), result);
+        EXPECT_EQ(contentOf(folder / "result_backup_1.txt"), "former");
+        EXPECT_EQ(folder.names(),
+                  (std::vector<std::string>{"new.edl", "old.edl", "result.txt", "result_backup_1.txt"}));
+        std::filesystem::remove(folder / "result_backup_1.txt");
+    }
 }
 
 TEST(BadOutput, DevicesAreWrittenAndStay)

@@ -140,7 +140,7 @@ struct Job {
 
     Outcome run(const Words& more = {}) const
     {
-        Words words{"apply", project, "--old", oldFile, "--new", newFile, "-o", result};
+        Words words{"apply", project, "--old", oldFile, "--new", newFile, "-o", result, "--overwrite"};
         words.insert(words.end(), more.begin(), more.end());
         return runCadrel(words);
     }
@@ -529,7 +529,7 @@ TEST(Keep, OutsideOfTheHullOfAGivenChangeEdlNothingIsTouched)
         "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:15:00 01:00:20:00", "01:00:10:00 01:00:15:00") +
                           cut("002", "B", "01:00:10:00 01:00:15:00", "01:00:15:00 01:00:20:00"));
 
-    const Outcome outcome = runCadrel({"apply", job.project, "--change", change, "-o", job.result});
+    const Outcome outcome = runCadrel({"apply", job.project, "--change", change, "-o", job.result, "--overwrite"});
 
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_EQ(placesOn("DIA", job.result),
@@ -545,14 +545,15 @@ TEST(Keep, WhatStandsInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
     const auto change = job.folder.write(
         "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:10:00 01:00:20:00", "01:00:14:00 01:00:24:00"));
 
-    const Outcome refused = runCadrel({"apply", job.project, "--change", change, "-o", job.result});
+    const Outcome refused = runCadrel({"apply", job.project, "--change", change, "-o", job.result, "--overwrite"});
 
     EXPECT_EQ(refused.status, 1);
     EXPECT_EQ(refused.err, "cadrel: " + change.string() +
                                ": 00:00:04:00 of sound or markers, from 01:00:20:00 on, stand where the change EDL "
                                "puts its stretches; make room for them, or give --force to let the cut win\n");
     EXPECT_FALSE(std::filesystem::exists(job.result));
-    const Outcome forced = runCadrel({"apply", job.project, "--change", change, "--force", "-o", job.result});
+    const Outcome forced =
+        runCadrel({"apply", job.project, "--change", change, "--force", "-o", job.result, "--overwrite"});
     EXPECT_EQ(forced.status, 0) << forced.err;
     EXPECT_TRUE(tells(forced.out, "Lost        01:00:20:00 - 01:00:24:00, for want of room\n")) << forced.out;
     EXPECT_EQ(placesOn("DIA", job.result),

@@ -116,6 +116,19 @@ Outcome runOnTerminal(const std::vector<std::string>& arguments, const std::stri
     return {exitStatusOf(child), shown, {}};
 }
 
+/// `act` is called once, as soon as the text is shown.
+Outcome runOnTerminalUntil(const std::string& text, const std::vector<std::string>& arguments,
+                           const std::function<void(pid_t child)>& act)
+{
+    bool isDone = false;
+    return runOnTerminal(arguments, {}, [&](pid_t child, const std::string& shown) {
+        if (isDone || shown.find(text) == std::string::npos)
+            return;
+        act(child);
+        isDone = true;
+    });
+}
+
 constexpr uid_t Nobody = 65534;
 
 bool isRoot()
@@ -186,13 +199,13 @@ Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std
 
 Outcome runCadrelInterruptedAt(const std::string& text, const std::vector<std::string>& arguments)
 {
-    bool isInterrupted = false;
-    return runOnTerminal(arguments, {}, [&](pid_t child, const std::string& shown) {
-        if (isInterrupted || shown.find(text) == std::string::npos)
-            return;
-        kill(child, SIGINT);
-        isInterrupted = true;
-    });
+    return runOnTerminalUntil(text, arguments, [](pid_t child) { kill(child, SIGINT); });
+}
+
+Outcome runCadrelDisturbedAt(const std::string& text, const std::vector<std::string>& arguments,
+                             const std::function<void()>& disturb)
+{
+    return runOnTerminalUntil(text, arguments, [&](pid_t) { disturb(); });
 }
 
 } // namespace cadrel::tests

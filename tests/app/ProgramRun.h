@@ -4,6 +4,7 @@
 
 #include "tests/support/TempFolder.h"
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -36,5 +37,8 @@ void giveToUnprivileged(const std::filesystem::path& path);
 Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std::string& environment = {});
 /// Likewise, and interrupts it, as Ctrl-C does, as soon as it shows the text.
 Outcome runCadrelInterruptedAt(const std::string& text, const std::vector<std::string>& arguments);
+/// Likewise, but does something else once it shows the text.
+Outcome runCadrelDisturbedAt(const std::string& text, const std::vector<std::string>& arguments,
+                             const std::function<void()>& disturb);
 
 } // namespace cadrel::tests
