@@ -3,6 +3,7 @@
 #include "app/CommandLine.h"
 
 #include "app/console/Failure.h"
+#include "app/console/Nearest.h"
 #include "app/console/Output.h"
 #include "app/console/Replacing.h"
 #include "app/edl/ProjectFramerate.h"
@@ -13,8 +14,10 @@
 #include <algorithm>
 #include <array>
 #include <cstdint>
+#include <functional>
 #include <iterator>
 #include <string>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -187,9 +190,8 @@ public:
         return m_command
             .add_flag_function(
                 option() + ",!" + offOption(),
-                [&given = m_given, kind](std::int64_t count) {
-                    given.changes.emplace_back(
-                        [kind, isOn = count > 0](Settings& settings) { settings.set(kind.option, isOn); });
+                [add = adder(), kind](std::int64_t count) {
+                    add([kind, isOn = count > 0](Settings& settings) { settings.set(kind.option, isOn); });
                 },
                 m_entry.help)
             ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
@@ -200,8 +202,8 @@ public:
         return m_command
             .add_option_function<std::string>(
                 option(),
-                [&given = m_given, kind](const std::string& word) {
-                    given.changes.emplace_back([kind, number = numberOf(word, kind.words)](Settings& settings) {
+                [add = adder(), kind](const std::string& word) {
+                    add([kind, number = numberOf(word, kind.words)](Settings& settings) {
                         settings.set(kind.option, number);
                     });
                 },
@@ -215,9 +217,8 @@ public:
         return m_command
             .add_option_function<std::int32_t>(
                 option(),
-                [&given = m_given, kind](std::int32_t frames) {
-                    given.changes.emplace_back(
-                        [kind, frames](Settings& settings) { settings.set(kind.option, frames); });
+                [add = adder(), kind](std::int32_t frames) {
+                    add([kind, frames](Settings& settings) { settings.set(kind.option, frames); });
                 },
                 m_entry.help)
             ->check(CLI::Range(0, MostFrames))
@@ -230,8 +231,8 @@ public:
         CLI::Option* const bound = m_command
                                        .add_option_function<Number>(
                                            option(),
-                                           [&given = m_given, kind](Number number) {
-                                               given.changes.emplace_back([kind, number](Settings& settings) {
+                                           [add = adder(), kind](Number number) {
+                                               add([kind, number](Settings& settings) {
                                                    settings.set(kind.isOn, true);
                                                    settings.set(kind.bound, number);
                                                });
@@ -254,21 +255,28 @@ public:
     CLI::Option* operator()(const VfxSetting&) const
     {
         return m_command.add_option(option(), m_given.vfxPatterns, m_entry.help)
-            ->type_name("PREFIX,POSTFIX")
+            ->type_name("PREFIX,POSTFIX|none")
             ->allow_extra_args(false);
     }
 
 private:
+    using Apply = std::function<void(Settings&)>;
+
+    /// Puts a change of this setting to what is given.
+    std::function<void(Apply)> adder() const
+    {
+        return [&given = m_given, &entry = m_entry](Apply apply) {
+            given.changes.push_back({&entry, std::move(apply)});
+        };
+    }
+
     std::string option() const { return std::string("--") + m_entry.name; }
     std::string offOption() const { return std::string("--no-") + m_entry.name; }
 
     CLI::Option* addOff(core::Option<bool> Settings::*isOn, const char* help) const
     {
         return m_command.add_flag_callback(
-            offOption(),
-            [&given = m_given, isOn] {
-                given.changes.emplace_back([isOn](Settings& settings) { settings.set(isOn, false); });
-            },
+            offOption(), [add = adder(), isOn] { add([isOn](Settings& settings) { settings.set(isOn, false); }); },
             help);
     }
 
@@ -332,6 +340,8 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
         ->check(CLI::IsMember(wordList(KeepWords)))
         ->type_name("WHAT");
     apply->add_flag("--force", options.isForced, "Go on where the files don't seem to belong together");
+    apply->add_flag("--fresh", options.isFresh,
+                    "Begin anew, without the settings and cuts that earlier runs have stored");
     addShift(*apply, options.generation.shifts);
     addRate(*apply, options.generation.load, "Stop when the project has another frame rate");
     addStrict(*apply, options.generation.load);
@@ -397,6 +407,51 @@ CLI::App* addShow(CLI::App& program, ShowOptions& options)
     return show;
 }
 
+std::vector<std::string> commandNames(const CLI::App& program)
+{
+    std::vector<std::string> names;
+    for (const CLI::App* const command : program.get_subcommands([](const CLI::App*) { return true; }))
+        names.push_back(command->get_name());
+    return names;
+}
+
+/// With their dashes.
+std::vector<std::string> optionNames(const CLI::App& command)
+{
+    std::vector<std::string> names;
+    for (const CLI::Option* const option : command.get_options()) {
+        for (const std::string& name : option->get_lnames())
+            names.push_back("--" + name);
+    }
+    return names;
+}
+
+/// Throws UsageError for a word that isn't one of those.
+void requireKnown(const char* kind, const std::string& typed, const std::vector<std::string>& words)
+{
+    if (std::find(words.begin(), words.end(), typed) != words.end())
+        return;
+    const std::string nearest = nearestWord(typed, words);
+    throw UsageError{std::string("there is no ") + kind + " " + typed,
+                     nearest.empty() ? "see --help" : "did you mean " + nearest + "?"};
+}
+
+/// Throws UsageError for the first command or option that there isn't: the parser may complain of what is missing instead.
+void requireKnownWords(const CLI::App& program, const std::vector<std::string>& arguments)
+{
+    const CLI::App* command = &program;
+    for (const std::string& argument : arguments) {
+        if (argument == "--")
+            return;
+        if (argument.starts_with("--")) {
+            requireKnown("option", argument.substr(0, argument.find('=')), optionNames(*command));
+        } else if (command == &program && !argument.starts_with("-")) {
+            requireKnown("command", argument, commandNames(program));
+            command = program.get_subcommand(argument);
+        }
+    }
+}
+
 } // namespace
 
 std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
@@ -415,8 +470,10 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
     try {
         program.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
-        if (error.get_exit_code() != 0)
+        if (error.get_exit_code() != 0) {
+            requireKnownWords(program, {argv + 1, argv + argc});
             throw UsageError{error.what()};
+        }
         program.exit(error); // --help and --version
         flushStandardOutput();
         return std::nullopt;

@@ -77,6 +77,20 @@ void checkOutputs(const ApplyOptions& options)
         refuseToOverwrite(taken, options.jsonFile);
 }
 
+HostedProject::Opening openingOf(const ApplyOptions& options)
+{
+    if (!options.isFresh)
+        return HostedProject::Opening::WithStored;
+    return options.inPlace ? HostedProject::Opening::FreshInPlace : HostedProject::Opening::Fresh;
+}
+
+/// Leaves the model as that of a project without any run. The settings forget their VFX patterns, too.
+void forgetStored(DataModel& model)
+{
+    model.reset();
+    model.settings() = Settings();
+}
+
 /// Throws Failure when the project doesn't run at the rate that the user gave.
 void requireRate(const ApplyOptions& options, const ProjectClock& clock)
 {
@@ -280,6 +294,8 @@ public:
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
         m_facts.changeNames = source.fileNames;
+        m_facts.settings.emplace(model.settings(), options.generation.settings, source.cuts.has_value(),
+                                 timeText(hosted.project(), clock));
         m_facts.written = targetOf(options);
         m_facts.jsonFile = Output::isFile(options.jsonFile) ? options.jsonFile : std::string();
         const Plausibility plausibility(model, options.projectFile, m_edls);
@@ -421,10 +437,12 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     shiftsOf(options);
 
     terminal.showProgress("reading " + fileNameOf(options.projectFile));
-    HostedProject hosted(options.projectFile, terminal);
+    HostedProject hosted(options.projectFile, terminal, openingOf(options));
     const ProjectClock clock = clockOf(hosted.project(), options.projectFile);
     requireRate(options, clock);
     hosted.endPreview();
+    if (options.isFresh)
+        forgetStored(hosted.model());
     configure(hosted.model().settings(), options.generation.settings);
     restrictRange(hosted.model().settings(), options.generation.settings.preserve);
     Preparation run(hosted, clock, options, terminal);

@@ -26,6 +26,7 @@ struct ApplyOptions {
     std::string jsonFile;                 ///< empty: none is written; "-": standard output
     Keep keep = Keep::All;
     bool isForced = false; ///< goes on where the files don't seem to belong together
+    bool isFresh = false;  ///< without what earlier runs have stored in the project
     bool inPlace = false;  ///< the result replaces the project
     bool summary = false;  ///< the totals alone
 };

@@ -4,6 +4,7 @@
 
 #include "app/apply/ProjectComparison.h"
 #include "app/edl/GenerationReport.h"
+#include "app/settings/SettingsReport.h"
 #include "core/keep/KeepPlan.h"
 #include "core/time/SecondsRange.h"
 
@@ -36,6 +37,7 @@ struct ApplyFacts {
 
     const core::DataModel& model;
     std::string projectName;
+    std::optional<SettingsReport> settings;
     double timeOrigin = 0.0;                    ///< of the project
     std::optional<GenerationReport> generation; ///< nothing where the change EDL was given
     std::vector<std::string> changeNames;       ///< its files then

@@ -57,6 +57,8 @@ ordered_json ApplyJson::toJson() const
         json.update(m_facts.generation->toJson());
     else
         json["change"] = {{"files", m_facts.changeNames}, {"invalid", changes.countInvalid()}};
+    if (m_facts.settings)
+        json["settings"] = m_facts.settings->toJson();
     json["runNeeded"] = m_facts.isRunNeeded;
     json["applied"] = m_facts.appliedCount;
     json["passedOver"] = std::move(passedOver);

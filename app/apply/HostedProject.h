@@ -25,8 +25,15 @@ class Terminal;
 /// told of the project. A run is requested as the window requests it, and done in the host's next idle call.
 class HostedProject {
 public:
-    /// Throws Failure when the file can't be read. The terminal shows the progress of a run.
-    HostedProject(const std::string& file, const Terminal& terminal);
+    /// What becomes of a stored model that can't be read.
+    enum class Opening {
+        WithStored,   ///< it is a failure
+        Fresh,        ///< it is dropped
+        FreshInPlace, ///< it is dropped, but for that of a newer version, which is a failure
+    };
+
+    /// Throws Failure when the file or its model can't be read. The terminal shows the progress of a run.
+    HostedProject(const std::string& file, const Terminal& terminal, Opening opening);
     HostedProject(const HostedProject&) = delete;
     HostedProject& operator=(const HostedProject&) = delete;
     ~HostedProject();
@@ -50,6 +57,7 @@ public:
     void saveOver(const std::string& file) { save(file, std::nullopt); }
 
 private:
+    void dropUnreadableModel(Opening opening);
     void save(const std::string& file, const std::optional<util::FileStamp>& expected);
 
     std::string m_file;

@@ -60,6 +60,7 @@ Framerate EdlLoader::chooseRate(const std::string& firstFile) const
         return Framerate::fromLabel(m_options.rateLabel);
     Framerate shown;
     const std::wstring path = toWide(firstFile);
+    requireEdlSize(firstFile);
     if (parserFor(path)->detect(path, shown) != Result::Ok)
         throw unreadable(firstFile);
     if (const auto framerate = ProjectFramerate::fromShownRate(shown))
@@ -100,6 +101,7 @@ void EdlLoader::refuseUnreadable(const LoadedEdl& edl)
 void EdlLoader::load(LoadedEdl& edl) const
 {
     const std::wstring path = toWide(edl.path);
+    requireEdlSize(edl.path);
     m_terminal.showProgress("reading " + fileNameOf(edl.path));
     try {
         const auto parser = parserFor(path);

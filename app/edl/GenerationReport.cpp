@@ -4,10 +4,13 @@
 
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
+#include "app/edl/ScreenTimecode.h"
+#include "core/edl/EventBase.h"
 #include "core/edl/HealedEvent.h"
 #include "core/model/DataModel.h"
 #include "core/time/Timecode.h"
 
+#include <unordered_set>
 #include <utility>
 
 namespace cadrel::app {
@@ -21,11 +24,6 @@ using nlohmann::ordered_json;
 
 namespace {
 
-ordered_json sideToJson(const EventList& events, const std::vector<std::string>& names)
-{
-    return {{"files", names}, {"events", events.size()}, {"invalid", events.countInvalid()}};
-}
-
 /// "93.6".
 std::string percentOf(const Coverage& coverage)
 {
@@ -38,8 +36,26 @@ std::string percentOf(const Coverage& coverage)
 std::string describeEvents(const EventList& events, const std::vector<std::string>& names)
 {
     const std::size_t invalid = events.countInvalid();
-    return toPrintable(joined(names)).text + ": " + counted(events.size(), "event") + ", " +
+    const std::string title = names.empty() ? "" : toPrintable(joined(names)).text + ": ";
+    return title + counted(events.size(), "event") + ", " +
            (invalid == 0 ? "all valid" : std::to_string(invalid) + " invalid");
+}
+
+ordered_json describeEventsAsJson(const EventList& events, const std::vector<std::string>& names)
+{
+    return {{"files", names}, {"events", events.size()}, {"invalid", events.countInvalid()}};
+}
+
+std::vector<std::string> edlFilesOf(const EventList& events)
+{
+    std::vector<std::string> files;
+    std::unordered_set<std::string> known;
+    for (const auto& event : events.events()) {
+        // What was generated wasn't read from any.
+        if (!event->edlFileName().empty() && known.insert(event->edlFileName()).second)
+            files.push_back(event->edlFileName());
+    }
+    return files;
 }
 
 GenerationReport::GenerationReport(const DataModel& model, const EventList& carried, Cuts cuts,
@@ -67,7 +83,7 @@ std::string GenerationReport::changeText() const
     if (m_healedEvents > 0)
         healed = ", " + std::to_string(m_healedEvents) + " of them healed from " + std::to_string(m_healedMembers);
     return "Change EDL  " + counted(m_model.changeEdl().size(), "event") + healed + "\n" + //
-           "Covered     " + timecode(m_coverage.coveredFrames) + " of " + timecode(m_coverage.programmeFrames) + ", " +
+           "Covered     " + shown(m_coverage.coveredFrames) + " of " + shown(m_coverage.programmeFrames) + ", " +
            percentOf(m_coverage) + " %\n";
 }
 
@@ -76,11 +92,11 @@ std::string GenerationReport::insertsText() const
     if (m_coverage.inserts.empty())
         return "Inserts     none\n";
     std::string text = "Inserts     " + std::to_string(m_coverage.inserts.size()) + ", together " +
-                       timecode(m_coverage.insertedFrames()) + "\n\n" +
+                       shown(m_coverage.insertedFrames()) + "\n\n" +
                        "            in           out          length       shot\n";
     for (const Insert& insert : m_coverage.inserts) {
-        text += "            " + timecode(insert.start) + "  " + timecode(insert.end) + "  " +
-                timecode(insert.frames()) + "  " + toPrintable(insert.shot, 40).text;
+        text += "            " + shown(insert.start) + "  " + shown(insert.end) + "  " + shown(insert.frames()) + "  " +
+                toPrintable(insert.shot, 40).text;
         text += insert.moreShots == 0 ? "\n" : " and " + std::to_string(insert.moreShots) + " more\n";
     }
     return text + "\n";
@@ -96,12 +112,17 @@ ordered_json GenerationReport::toJson() const
                            {"shot", insert.shot},
                            {"moreShots", insert.moreShots}});
     }
-    return {{"old", sideToJson(m_model.oldEdl(), m_cuts.oldNames)},
-            {"new", sideToJson(m_model.newEdl(), m_cuts.newNames)},
+    return {{"old", describeEventsAsJson(m_model.oldEdl(), m_cuts.oldNames)},
+            {"new", describeEventsAsJson(m_model.newEdl(), m_cuts.newNames)},
             {"healed", {{"events", m_healedEvents}, {"members", m_healedMembers}}},
             {"programmeFrames", m_coverage.programmeFrames},
             {"coveredFrames", m_coverage.coveredFrames},
             {"inserts", std::move(inserts)}};
+}
+
+std::string GenerationReport::shown(std::int32_t frames) const
+{
+    return onScreen(timecode(frames), m_framerate);
 }
 
 std::string GenerationReport::timecode(std::int32_t frames) const

@@ -11,6 +11,7 @@
 #include "app/edl/EventJson.h"
 #include "app/edl/EventTable.h"
 #include "app/edl/ProjectFramerate.h"
+#include "app/edl/ScreenTimecode.h"
 #include "core/edl/EventBase.h"
 #include "core/time/Timecode.h"
 
@@ -70,9 +71,12 @@ std::string toText(const Totals& totals, const std::string& rate)
                        "            " + counted(totals.byTransition[0], "cut") + ", " +
                        counted(totals.byTransition[1], "dissolve") + ", " + counted(totals.byTransition[2], "wipe") +
                        ", " + std::to_string(totals.retimed) + " retimed\n";
+    const auto timecodeText = [](const Timecode& timecode) {
+        return onScreen(timecode.toString(), Timecode::framerate());
+    };
     if (totals.start)
-        text += "Programme   " + totals.start->toString() + " - " + totals.end->toString() + ", " +
-                (*totals.end - *totals.start).toString() + " long\n";
+        text += "Programme   " + timecodeText(*totals.start) + " - " + timecodeText(*totals.end) + ", " +
+                timecodeText(*totals.end - *totals.start) + " long\n";
     return text + "Frame rate  " + rate + "\n";
 }
 

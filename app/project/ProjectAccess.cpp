@@ -61,4 +61,10 @@ ProjectClock clockOf(const standin::Project& project, const std::string& file)
     }
 }
 
+SettingsReport::TimeText timeText(const standin::Project& project, const ProjectClock& clock)
+{
+    // The settings count by the project's clock, and the clock from the start of the project.
+    return [&](double seconds) { return clock.exactTimecode(seconds - project.timeOrigin()); };
+}
+
 } // namespace cadrel::app

@@ -4,6 +4,7 @@
 
 #include "app/console/Failure.h"
 #include "app/project/ProjectClock.h"
+#include "app/settings/SettingsReport.h"
 
 #include <string>
 
@@ -25,5 +26,8 @@ Failure changedFailure(const standin::ProjectFileChanged& error, const std::stri
 
 /// Throws Failure for a project with a rate at which there is no timecode.
 ProjectClock clockOf(const standin::Project& project, const std::string& file);
+
+/// How a report writes the times of its settings. Both outlive it.
+SettingsReport::TimeText timeText(const standin::Project& project, const ProjectClock& clock);
 
 } // namespace cadrel::app

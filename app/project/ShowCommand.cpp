@@ -14,6 +14,7 @@
 #include "app/project/ProjectContent.h"
 #include "app/project/ProjectJson.h"
 #include "app/project/ProjectListing.h"
+#include "app/project/StoredModel.h"
 #include "standin/base/Utf16.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
@@ -88,21 +89,23 @@ Tracks tracksNamed(Project& project, const ShowOptions& options)
                   names.empty() ? "it has no tracks at all" : "give one of " + joined(names)};
 }
 
-void writeJson(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
+void writeJson(Project& project, const ProjectClock& clock, const StoredModel& stored, const Tracks& tracks,
+               const ShowOptions& options)
 {
     std::optional<Interruption> interruption;
     if (!Output::isStandardOutput(options.jsonFile))
         interruption.emplace();
     Output json(options.jsonFile);
-    ProjectJson(project, clock, [&json](std::string_view text) {
+    ProjectJson(project, clock, stored, [&json](std::string_view text) {
         json.write(text);
     }).write(fileNameOf(options.projectFile), tracks);
     json.place();
 }
 
-void print(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
+void print(Project& project, const ProjectClock& clock, const StoredModel& stored, const Tracks& tracks,
+           const ShowOptions& options)
 {
-    const ProjectListing listing(project, clock, Terminal::wantsColour());
+    const ProjectListing listing(project, clock, stored, Terminal::wantsColour());
     if (!options.trackName.empty()) {
         listing.printContent(std::cout, tracks);
         return;
@@ -129,14 +132,15 @@ void runShow(const ShowOptions& options, Terminal& terminal)
         refuseToOverwrite({options.projectFile}, options.jsonFile);
     Project& project = read(options.projectFile, terminal);
     const ProjectClock clock = clockOf(project, options.projectFile);
+    const StoredModel stored(project, clock);
     const Tracks tracks = tracksNamed(project, options);
 
     terminal.clearProgress();
     if (!options.jsonFile.empty())
-        writeJson(project, clock, tracks, options);
+        writeJson(project, clock, stored, tracks, options);
     if (jsonOnly)
         return;
-    print(project, clock, tracks, options);
+    print(project, clock, stored, tracks, options);
     flushStandardOutput();
 }
 

@@ -95,7 +95,13 @@ void Project::readModel()
 
     // The timecodes in the block are those of this project.
     const FramerateScope ownRate(*this);
-    block >> m_model;
+    try {
+        block >> m_model;
+    } catch (...) {
+        // The model empties itself, but for the VFX patterns that it has read.
+        m_model.settings() = core::Settings();
+        throw;
+    }
     if (isPreviewing() && resultOf([&] { readPreviewEvents(*list); }) != Result::Ok)
         m_previewEvents->clear();
 }
