@@ -177,4 +177,20 @@ TEST(CommandLine, TheProgressLineIsForTerminalsOnlyAndGoesAway)
     EXPECT_EQ(runCadrel({"list", file}).err, "");
 }
 
+TEST(CommandLine, TheProgressLineDoesntWrapOnANarrowTerminal)
+{
+    const TempFolder folder;
+    const std::string file = folder.write("a rather long name.edl", oldCut());
+    const std::string cutAt19 = "reading a rather l\xe2\x80\xa6\r\033[K";
+    const auto shownOn = [&](unsigned short columns) {
+        return runCadrelOnNarrowTerminal({"list", file, "--summary"}, columns).out;
+    };
+
+    EXPECT_NE(shownOn(20).find(cutAt19), std::string::npos) << shownOn(20);
+    // "reading a rather long name.edl" has 30 columns, and a line that is filled to its last one may wrap.
+    EXPECT_EQ(shownOn(30).find("reading a rather long name.edl"), std::string::npos);
+    EXPECT_NE(shownOn(31).find("reading a rather long name.edl\r"), std::string::npos);
+    EXPECT_NE(shownOn(0).find("reading a rather long name.edl\r"), std::string::npos);
+}
+
 } // namespace
