@@ -72,7 +72,15 @@ void Project::load()
 {
     findLockedTracks();
     FirstFailure failure;
-    failure.ofStep([this] { readModel(); });
+    failure.ofStep([this] {
+        try {
+            readModel();
+        } catch (...) {
+            // The model has emptied itself, but for the VFX patterns that it has read.
+            m_model.settings() = core::Settings();
+            throw;
+        }
+    });
     if (!m_model.isPreviewActive()) {
         // There is no preview that the user could switch off. If a track can't be unlocked here, the next run unlocks
         // it.
@@ -95,13 +103,7 @@ void Project::readModel()
 
     // The timecodes in the block are those of this project.
     const FramerateScope ownRate(*this);
-    try {
-        block >> m_model;
-    } catch (...) {
-        // The model empties itself, but for the VFX patterns that it has read.
-        m_model.settings() = core::Settings();
-        throw;
-    }
+    block >> m_model;
     if (isPreviewing() && resultOf([&] { readPreviewEvents(*list); }) != Result::Ok)
         m_previewEvents->clear();
 }
