@@ -6,6 +6,7 @@
 #include "app/console/Nearest.h"
 #include "app/console/Output.h"
 #include "app/console/Replacing.h"
+#include "app/console/Wording.h"
 #include "app/edl/ProjectFramerate.h"
 #include "app/settings/SettingsTable.h"
 #include "core/settings/Settings.h"
@@ -84,7 +85,8 @@ Examples:
 constexpr const char* ListHelp =
     R"(Each event is "ok", or its state says which kind of flaw it has: "format" for a field that can't be read,
 "timecode" for a time that doesn't exist at the frame rate, "range" for an end before its start. What is wrong
-stands under the event. With --json - only the JSON goes to standard output.
+stands under the event. A line that makes no event is named in a warning. With --json - only the JSON goes to
+standard output.
 
 Examples:
   cadrel list reel3_v12.edl
@@ -145,10 +147,23 @@ CLI::Option* addFiles(CLI::App& command, const char* name, std::vector<std::stri
     return command.add_option(name, files, help)->type_name("FILE");
 }
 
+/// Replaces a rate by its label, or says what is wrong with it.
+std::string toRateLabel(std::string& text)
+{
+    if (const auto label = ProjectFramerate::labelMeant(text)) {
+        text = *label;
+        return {};
+    }
+    if (text.ends_with("dfps"))
+        return app::quoted(text) +
+               " is not supported; drop-frame timecode counts 30 frames, at 29.97 dfps and 30 dfps alone";
+    return app::quoted(text) + " is none of " + joined(wordList(ProjectFramerate::Labels));
+}
+
 void addRate(CLI::App& command, LoadOptions& load, const char* help)
 {
     command.add_option("--rate", load.rateLabel, help)
-        ->check(CLI::IsMember(wordList(ProjectFramerate::Labels)))
+        ->transform(CLI::Validator(toRateLabel, "", "rate"))
         ->type_name("LABEL");
 }
 
@@ -163,7 +178,8 @@ void addShift(CLI::App& command, std::vector<std::string>& shifts)
 
 void addStrict(CLI::App& command, LoadOptions& load)
 {
-    command.add_flag("--strict", load.strict, "Stop at a file that doesn't fit the frame rate, instead of warning");
+    command.add_flag("--strict", load.strict,
+                     "Stop at a line that can't be read or a file that doesn't fit the frame rate, instead of warning");
 }
 
 /// The options that say how EDLs are read without a project.

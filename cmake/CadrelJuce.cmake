@@ -1,5 +1,5 @@
-# cadrel_juce: the JUCE modules that the window needs, built once from Debian's juce-modules-source. Its headers are system
-# headers, and its own code has none of our warnings.
+# The JUCE modules, built once from Debian's juce-modules-source. Their headers are system headers, and their own code has none
+# of our warnings.
 
 find_path(CADREL_JUCE_MODULES juce_core/juce_core.h PATHS /usr/share/juce/modules NO_DEFAULT_PATH REQUIRED
     DOC "The folder of the JUCE modules")
@@ -9,12 +9,14 @@ find_package(PNG REQUIRED)
 find_package(Threads REQUIRED)
 find_package(ZLIB REQUIRED)
 
-set(CADREL_JUCE_MODULE_NAMES juce_core juce_events juce_graphics)
+find_package(X11 REQUIRED COMPONENTS Xext Xinerama Xrandr Xcursor OPTIONAL_COMPONENTS Xtst)
 
-# cadrel_juce_library(name [option...]): the modules, compiled with the options alone or, without any, as all else is.
+# cadrel_juce_library(name MODULE module... [OPTIONS option...]): the modules, compiled with the options alone or, without any,
+# as all else is.
 function(cadrel_juce_library target)
+    cmake_parse_arguments(PARSE_ARGV 1 ARG "" "" "MODULE;OPTIONS")
     set(sources)
-    foreach(module IN LISTS CADREL_JUCE_MODULE_NAMES)
+    foreach(module IN LISTS ARG_MODULE)
         list(APPEND sources ${CADREL_JUCE_MODULES}/${module}/${module}.cpp)
     endforeach()
     add_library(${target} STATIC ${sources})
@@ -27,14 +29,17 @@ function(cadrel_juce_library target)
         JUCE_STANDALONE_APPLICATION=0
         JUCE_USE_CURL=0
         $<IF:$<CONFIG:Debug>,_DEBUG=1,NDEBUG=1>)
-    foreach(module IN LISTS CADREL_JUCE_MODULE_NAMES)
+    foreach(module IN LISTS ARG_MODULE)
         target_compile_definitions(${target} PUBLIC JUCE_MODULE_AVAILABLE_${module}=1)
     endforeach()
     target_link_libraries(${target}
         PRIVATE Freetype::Freetype JPEG::JPEG PNG::PNG ZLIB::ZLIB
         PUBLIC Threads::Threads ${CMAKE_DL_LIBS})
-    if(ARGN)
-        set_target_properties(${target} PROPERTIES COMPILE_OPTIONS "${ARGN}")
+    # A second JUCE in the process must not take the place of this one.
+    set_target_properties(${target} PROPERTIES
+        POSITION_INDEPENDENT_CODE ON CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON)
+    if(ARG_OPTIONS)
+        set_target_properties(${target} PROPERTIES COMPILE_OPTIONS "${ARG_OPTIONS}")
     endif()
     if(CADREL_CCACHE)
         # A module holds the time of its compilation, and would never be found in the cache for it.
@@ -43,4 +48,7 @@ function(cadrel_juce_library target)
     endif()
 endfunction()
 
-cadrel_juce_library(cadrel_juce)
+# What pictures need, and what the window needs besides.
+set(CADREL_JUCE_PICTURE_MODULES juce_core juce_events juce_graphics)
+cadrel_juce_library(cadrel_juce
+    MODULE ${CADREL_JUCE_PICTURE_MODULES} juce_data_structures juce_gui_basics)

@@ -26,8 +26,8 @@ function(cadrel_warnings target)
     target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Werror)
 endfunction()
 
-# cadrel_library(name FOLDER folder... [LINK library...]): a static library of all sources of the folders, or an interface
-# where there are headers alone.
+# cadrel_library(name FOLDER folder... [LINK library...]): a static library of all sources of the folders, which a module can
+# link too, or an interface where there are headers alone.
 function(cadrel_library target)
     cmake_parse_arguments(PARSE_ARGV 1 ARG "" "" "FOLDER;LINK")
     set(sources)
@@ -44,6 +44,8 @@ function(cadrel_library target)
     add_library(${target} STATIC ${sources})
     target_include_directories(${target} PUBLIC ${PROJECT_SOURCE_DIR}/src)
     target_link_libraries(${target} PUBLIC ${ARG_LINK})
+    set_target_properties(${target} PROPERTIES
+        POSITION_INDEPENDENT_CODE ON CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON)
     cadrel_warnings(${target})
 endfunction()
 

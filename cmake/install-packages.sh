@@ -4,7 +4,7 @@
 set -eu
 
 needed="build-essential cmake libcli11-dev nlohmann-json3-dev libpugixml-dev juce-modules-source libgtest-dev librapidcheck-dev
-libcairo2-dev pkg-config"
+libcairo2-dev pkg-config libx11-dev libxext-dev libxinerama-dev libxrandr-dev libxcursor-dev libxtst-dev xvfb"
 helpful="ninja-build ccache"
 case $1 in
 release) needed="$needed libbenchmark-dev" ;;

@@ -71,6 +71,23 @@ void checkAudio(const core::EventList& without, const core::EventList& with)
     }
 }
 
+/// A thorough reading loses no event that a plain one takes, and what it tells can be found.
+void checkThorough(const std::wstring& path, const core::EventList& plain)
+{
+    core::fileio::CmxParser parser;
+    parser.readThoroughly();
+    Read thorough;
+    check(parser.parse(path, thorough.events, thorough.framerate, false) == util::Result::Ok,
+          "every regular file is read thoroughly");
+    check(thorough.events.size() >= plain.size(), "a thorough reading takes what a plain one takes");
+    for (const auto& event : thorough.events.events())
+        checkEvent(*event);
+    for (const auto& [line, problem] : parser.remarks().unreadLines) {
+        check(line.number > 0 && line.text.size() <= 515, "an unread line has a number and a text of some length");
+        check(!problem.empty(), "an unread line has a problem");
+    }
+}
+
 void checkWrittenCuts(const tests::TempFolder& folder, const core::EventList& events)
 {
     core::EventList cuts;
@@ -114,6 +131,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
           "every regular file shows a rate or none");
     check(sameRate(detected, video.framerate), "looking for the rate alone gives the rate of the reading");
 
+    checkThorough(path, video.events);
     checkWrittenCuts(folder, video.events);
     return 0;
 }

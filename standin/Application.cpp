@@ -20,8 +20,8 @@
 #include "standin/services/MenuRegistry.h"
 #include "standin/services/ProgressService.h"
 #include "standin/services/Translations.h"
-#include "standin/services/ViewManager.h"
 #include "standin/services/WindowFactoryRegistry.h"
+#include "standin/window/ViewManager.h"
 
 #include <string>
 #include <system_error>
@@ -61,6 +61,7 @@ struct Application::Services {
     Counted<MenuRegistry> menus = makeCounted<MenuRegistry>();
     Counted<ProgressService> progress = makeCounted<ProgressService>(terminal);
     Counted<Translations> translations = makeCounted<Translations>();
+    Counted<ViewManager> views = makeCounted<ViewManager>();
     Counted<WindowFactoryRegistry> windowFactories = makeCounted<WindowFactoryRegistry>();
     Counted<ProjectManager> projects = makeCounted<ProjectManager>(*dependencies);
     Counted<EditService> edits = makeCounted<EditService>(*projects);
@@ -85,12 +86,13 @@ Application::Application(const Terminal& terminal) : m_services(std::make_unique
     context.offer<IProjectManager>(projects());
     context.offer<ITranslationService>(translations());
     context.offer<ITransportControl>(transport());
-    context.offer<IViewManager>(*makeCounted<ViewManager>());
+    context.offer<IViewManager>(views());
     context.offer<IWindowFactoryRegistry>(windowFactories());
 }
 
 Application::~Application()
 {
+    views().closeAll();
     while (!projects().projects().empty())
         closeProject(*projects().projects().back());
 }
@@ -146,6 +148,12 @@ void Application::idle()
         }
     }
     idleManager().callHandlers();
+    views().idle();
+}
+
+bool Application::choose(const MenuRegistry::Command& command)
+{
+    return actions().invoke(command.category.c_str(), command.action.c_str(), 0) == ResultOk;
 }
 
 ActionManager& Application::actions()
@@ -201,6 +209,11 @@ Translations& Application::translations()
 Transport& Application::transport()
 {
     return *m_services->transport;
+}
+
+ViewManager& Application::views()
+{
+    return *m_services->views;
 }
 
 WindowFactoryRegistry& Application::windowFactories()

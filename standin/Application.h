@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "standin/services/MenuRegistry.h"
 #include "standin/services/Terminal.h"
 #include "util/FileStamp.h"
 #include "velmark/Context.h"
@@ -20,12 +21,12 @@ class EditService;
 class FileSelector;
 class HostContext;
 class IdleManager;
-class MenuRegistry;
 class ProgressService;
 class Project;
 class ProjectManager;
 class Translations;
 class Transport;
+class ViewManager;
 class WindowFactoryRegistry;
 
 /// The stand-in host as a whole: its services, its open projects and its idle call. A module is given `context()` and works
@@ -57,8 +58,10 @@ public:
     void closeProject(Project& project);
 
     /// What a host does when the user does nothing: tells of the edits that were made outside of transactions, then calls
-    /// the idle handlers unless they are blocked.
+    /// the idle handlers unless they are blocked, and always the views of the windows.
     void idle();
+    /// What a host does when the user chooses an item of a menu. Whether somebody carried it out.
+    bool choose(const MenuRegistry::Command& command);
 
     ActionManager& actions();
     AlertService& alerts();
@@ -71,6 +74,7 @@ public:
     ProjectManager& projects();
     Translations& translations();
     Transport& transport();
+    ViewManager& views();
     WindowFactoryRegistry& windowFactories();
 
 private:

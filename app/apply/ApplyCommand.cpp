@@ -8,7 +8,6 @@
 #include "app/apply/HostedProject.h"
 #include "app/apply/KeptRun.h"
 #include "app/apply/Plausibility.h"
-#include "app/apply/ProgrammeShift.h"
 #include "app/apply/ProjectComparison.h"
 #include "app/apply/RunMaterial.h"
 #include "app/console/Failure.h"
@@ -20,6 +19,7 @@
 #include "app/edl/EventJson.h"
 #include "app/project/ProjectAccess.h"
 #include "app/project/ProjectClock.h"
+#include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
 #include "core/model/DataModel.h"
@@ -35,6 +35,7 @@
 #include <optional>
 #include <string_view>
 #include <utility>
+#include <vector>
 
 namespace cadrel::app {
 
@@ -44,6 +45,7 @@ using core::EventFlaw;
 using core::EventList;
 using core::FrameRanges;
 using core::Framerate;
+using core::ProgrammeShift;
 using core::Settings;
 using core::Timecode;
 
@@ -140,7 +142,7 @@ FileShifts shiftsOf(const ApplyOptions& options)
 /// What the change EDL of the model was made of.
 struct ChangeSource {
     std::optional<Cuts> cuts; ///< nothing when it was given
-    std::vector<std::string> fileNames;
+    ReadFiles files;          ///< its files then
 };
 
 /// Puts the change EDL into the model, and both cuts when it is made of them. Throws Failure.
@@ -237,18 +239,38 @@ void require(const std::optional<Failure>& doubt, const ApplyOptions& options)
         throw *doubt;
 }
 
-/// Takes the markers of earlier runs out that a run has replaced by its own, so that those count as new where they are the
+/// What a run leaves of a marker of an earlier one; `changed` in seconds of the project.
+std::vector<Placement> leftOf(const Placement& marker, const core::SecondsRange& changed)
+{
+    const bool startsIn =
+        marker.start - changed.start > -standin::SameInstant && changed.end - marker.start >= standin::SameInstant;
+    if (marker.kind == Placement::Kind::Point)
+        return startsIn ? std::vector<Placement>() : std::vector{marker};
+    Placement before = marker;
+    before.end = std::min(marker.end, changed.start);
+    Placement after = marker;
+    after.start = std::max(marker.start, changed.end);
+    std::vector<Placement> left{before, after};
+    std::erase_if(left, [](const Placement& piece) { return piece.length() < standin::SameInstant; });
+    return left;
+}
+
+/// Takes out of the markers of earlier runs what a run has replaced by its own, so that those count as new where they are the
 /// same. `changed` is what the run may change, in seconds of the project's clock; null for all.
 void forgetReplacedMarkers(ProjectState& state, const core::SecondsRange* changed, double origin)
 {
-    const auto isReplaced = [&](const Placement& marker) {
-        const double start = marker.start + origin;
-        return !changed ||
-               (start - changed->start > -standin::SameInstant && changed->end - start >= standin::SameInstant);
-    };
     for (auto& [track, placements] : state) {
-        if (isMarkedByRuns(*track) && !track->isLocked())
-            std::erase_if(placements, isReplaced);
+        if (!isMarkedByRuns(*track) || track->isLocked())
+            continue;
+        std::vector<Placement> left;
+        for (const Placement& marker : placements) {
+            if (!changed)
+                break;
+            for (Placement& piece : leftOf(marker, {changed->start - origin, changed->end - origin}))
+                left.push_back(std::move(piece));
+        }
+        std::ranges::stable_sort(left, {}, &Placement::start);
+        placements = std::move(left);
     }
 }
 
@@ -293,7 +315,8 @@ public:
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
-        m_facts.changeNames = source.fileNames;
+        m_facts.changeNames = source.files.names;
+        m_facts.changeUnread = source.files.unread;
         m_facts.settings.emplace(model.settings(), options.generation.settings, source.cuts.has_value(),
                                  timeText(hosted.project(), clock));
         m_facts.written = targetOf(options);

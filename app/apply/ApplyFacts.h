@@ -41,6 +41,7 @@ struct ApplyFacts {
     double timeOrigin = 0.0;                    ///< of the project
     std::optional<GenerationReport> generation; ///< nothing where the change EDL was given
     std::vector<std::string> changeNames;       ///< its files then
+    std::vector<UnreadOfFile> changeUnread;     ///< and their lines that were not read
     std::vector<PassedOver> passedOver;
     std::size_t appliedCount = 0;
     bool isRunNeeded = true; ///< false: the project is as the new cut needs it

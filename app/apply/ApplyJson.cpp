@@ -56,7 +56,9 @@ ordered_json ApplyJson::toJson() const
     if (m_facts.generation)
         json.update(m_facts.generation->toJson());
     else
-        json["change"] = {{"files", m_facts.changeNames}, {"invalid", changes.countInvalid()}};
+        json["change"] = {{"files", m_facts.changeNames},
+                          {"invalid", changes.countInvalid()},
+                          {"unread", app::toJson(m_facts.changeUnread)}};
     if (m_facts.settings)
         json["settings"] = m_facts.settings->toJson();
     json["runNeeded"] = m_facts.isRunNeeded;

@@ -154,7 +154,8 @@ void ApplyListing::printTotals(std::ostream& out) const
         out << m_facts.generation->cutsText(rate) << m_facts.generation->changeText();
     else
         out << "Frame rate  " << rate << '\n'
-            << "Change EDL  " << describeEvents(model.changeEdl(), m_facts.changeNames) << '\n';
+            << "Change EDL  " << describeEvents(model.changeEdl(), m_facts.changeNames, countOf(m_facts.changeUnread))
+            << '\n';
     if (m_facts.settings)
         out << m_facts.settings->text("Settings    ");
     if (!m_facts.matchText.empty())

@@ -106,7 +106,12 @@ std::optional<Failure> Plausibility::doubtOfLastCut(const EventList& lastCut) co
     const Settings& settings = m_model.settings();
     PictureNames names(settings.matchBy(), settings.vfxPatterns());
     const PictureLine last(lastCut, names, m_framerate);
-    const PictureLine given(m_model.oldEdl(), names, m_framerate);
+    // A project doesn't store which shots are reversed.
+    EventList oldCut;
+    oldCut.copyFrom(m_model.oldEdl());
+    for (const auto& event : oldCut.events())
+        event->setReversed(false);
+    const PictureLine given(oldCut, names, m_framerate);
     const FrameRange day{0, m_framerate.lastFrame + 1};
     const FrameRanges different =
         intersect(PictureComparison(last, given).differencesUnder(0, day), intersect(last.lit(), given.lit()));

@@ -2,7 +2,7 @@
 
 #include "app/apply/ProjectComparison.h"
 
-#include "app/apply/ProgrammeShift.h"
+#include "core/cut/ProgrammeShift.h"
 
 #include <algorithm>
 #include <bit>
@@ -17,6 +17,7 @@
 
 namespace cadrel::app {
 
+using core::ProgrammeShift;
 using standin::SameInstant;
 using standin::Track;
 

@@ -9,9 +9,11 @@
 #include <string>
 #include <vector>
 
-namespace cadrel::app {
-
+namespace cadrel::core {
 class ProgrammeShift;
+} // namespace cadrel::core
+
+namespace cadrel::app {
 
 /// A clip or a marker with its place at one moment. For a part, each of its clips is listed.
 struct Placement {
@@ -67,6 +69,6 @@ struct TrackComparison {
 /// Compares the tracks of a project, from top to bottom and without folders, with what was on them. A clip may have
 /// come from any place that played the same stretch of the same media; `shift` says which one it should be.
 std::vector<TrackComparison> compare(const ProjectState& before, const standin::Project& after,
-                                     const ProgrammeShift& shift);
+                                     const core::ProgrammeShift& shift);
 
 } // namespace cadrel::app

@@ -84,7 +84,8 @@ std::vector<SecondsRange> RunMaterial::sound() const
 bool RunMaterial::hasTracks() const
 {
     const Tracks tracks = tracksOf(m_project);
-    return std::any_of(tracks.begin(), tracks.end(), [](const Track* track) { return canBeChanged(*track); });
+    return std::any_of(tracks.begin(), tracks.end(),
+                       [](const Track* track) { return canBeChanged(*track) && !isMarkedByRuns(*track); });
 }
 
 bool isMarkedByRuns(const Track& track)

@@ -4,7 +4,6 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Paths.h"
-#include "app/console/Printable.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
 #include "app/edl/ProjectFramerate.h"
@@ -16,6 +15,9 @@
 #include "util/StringUtil.h"
 
 #include <algorithm>
+#include <array>
+#include <cstddef>
+#include <cstdint>
 
 namespace cadrel::app {
 
@@ -25,24 +27,26 @@ using core::Framerate;
 using core::Timecode;
 using core::fileio::parserFor;
 using core::fileio::SourceLine;
+using core::fileio::UnreadLine;
 using util::Result;
 using util::StringUtil;
 
 namespace {
 
-/// A line of a file, shown in a message.
-constexpr std::size_t MostCharactersOfALine = 120;
+/// Of the unread lines of a file; the rest is counted.
+constexpr std::size_t MostLinesTold = 10;
+
+/// The fewest timecodes that tell a lower rate by the frames that none of them has. At 24 and 25 frames a second, one file of
+/// 3500 of this size would tell it wrongly.
+constexpr std::size_t FewestTimecodesForALowerRate = 200;
+
+/// The nominal rates that timecodes show.
+constexpr std::array<std::int32_t, 4> NominalRates{24, 25, 30, 60};
 
 /// The line that an event was read from.
 SourceLine lineOf(const EventBase& event)
 {
     return {event.sourceLine(), event.comment().substr(0, event.comment().find('\n'))};
-}
-
-/// `line 12: "001 AX ..."`.
-std::string quoted(const SourceLine& line)
-{
-    return "line " + std::to_string(line.number) + ": \"" + toPrintable(line.text, MostCharactersOfALine).text + "\"";
 }
 
 /// Whether a frames field of the event is beyond the rate.
@@ -52,22 +56,33 @@ bool exceeds(const EventBase& event, std::int32_t framesPerSecond)
     return beyond(event.srcIn()) || beyond(event.srcOut()) || beyond(event.dstIn()) || beyond(event.dstOut());
 }
 
+constexpr const char* LineRemedy = "correct the list, and save it as plain text";
+
+/// The first of the lines, and how many there are more.
+std::string firstOf(const std::vector<UnreadLine>& unread)
+{
+    const std::size_t more = unread.size() - 1;
+    return textOf(unread.front()) + (more == 0 ? "" : ", and " + counted(more, "more line") + " like that");
+}
+
 } // namespace
 
 Framerate EdlLoader::chooseRate(const std::string& firstFile) const
 {
     if (!m_options.rateLabel.empty())
-        return Framerate::fromLabel(m_options.rateLabel);
+        return ProjectFramerate::fromLabel(m_options.rateLabel);
     Framerate shown;
     const std::wstring path = toWide(firstFile);
     requireEdlSize(firstFile);
-    if (parserFor(path)->detect(path, shown) != Result::Ok)
+    const auto parser = parserFor(path);
+    parser->readThoroughly();
+    if (parser->detect(path, shown) != Result::Ok)
         throw unreadable(firstFile);
     if (const auto framerate = ProjectFramerate::fromShownRate(shown))
         return *framerate;
     // A file without anything readable needs different advice. At 60 frames a second every timecode can be read.
     const ProjectFramerate anyRate(Framerate(60, 0));
-    LoadedEdl edl{firstFile, core::EventList(), {}, {}};
+    LoadedEdl edl{firstFile, core::EventList(), {}, {}, {}};
     load(edl);
     refuseUnreadable(edl);
     throw Failure{firstFile, "shows no frame rate", "give it with --rate, such as --rate \"24 fps\""};
@@ -82,6 +97,7 @@ std::list<LoadedEdl> EdlLoader::load(const std::vector<std::string>& files) cons
             LoadedEdl& edl = edls.emplace_back();
             edl.path = file;
             load(edl);
+            tellUnread(edl);
             checkRate(edl);
             m_options.shifts.apply(edl.path, edl.events, m_options.shiftedTimes);
         }
@@ -105,20 +121,52 @@ void EdlLoader::load(LoadedEdl& edl) const
     m_terminal.showProgress("reading " + fileNameOf(edl.path));
     try {
         const auto parser = parserFor(path);
+        parser->readThoroughly();
         edl.events.load(path, edl.shown, m_options.renameBRolls, m_options.acceptAudio, *parser);
         edl.rateLine = parser->rateLine();
+        edl.remarks = parser->remarks();
     } catch (const Result::Type&) {
         throw unreadable(edl.path);
     }
-    if (edl.events.isEmpty())
+    if (!edl.events.isEmpty())
+        return;
+    const auto& unread = edl.remarks.unreadLines;
+    if (unread.empty())
         throw Failure{edl.path, "holds no events", "give a CMX EDL"};
+    throw Failure{edl.path, "holds no event that can be read; " + firstOf(unread), LineRemedy};
+}
+
+void EdlLoader::tellUnread(const LoadedEdl& edl) const
+{
+    const auto& unread = edl.remarks.unreadLines;
+    if (m_options.strict && !unread.empty())
+        throw Failure{edl.path, firstOf(unread), LineRemedy};
+    const std::size_t told = std::min(unread.size(), MostLinesTold);
+    for (std::size_t index = 0; index < told; ++index)
+        m_terminal.warn({edl.path, textOf(unread[index]), LineRemedy});
+    if (told < unread.size())
+        m_terminal.warn(
+            {edl.path, "and " + counted(unread.size() - told, "more line") + " like that", "--json lists them all"});
+}
+
+/// A warning, or a failure where warnings are failures.
+void EdlLoader::tell(const Failure& failure) const
+{
+    if (m_options.strict)
+        throw failure;
+    m_terminal.warn(failure);
 }
 
 void EdlLoader::checkRate(const LoadedEdl& edl) const
 {
     const Framerate project = Timecode::framerate();
     const std::string label = ProjectFramerate::labelOf(project);
-    const bool faster = edl.shown.framesPerSecond > project.framesPerSecond;
+    const bool hasFrames = edl.rateLine || edl.remarks.highestFrame >= project.framesPerSecond;
+    const bool faster = edl.shown.framesPerSecond > project.framesPerSecond && hasFrames;
+    if (!faster) {
+        checkLowerRate(edl);
+        checkDropFrame(edl);
+    }
     const auto& events = edl.events.events();
     const auto first = std::find_if(events.begin(), events.end(), [&](const std::shared_ptr<EventBase>& event) {
         return faster ? exceeds(*event, project.framesPerSecond) : event->hasFlaw(EventFlaw::TimecodeInvalid);
@@ -131,10 +179,35 @@ void EdlLoader::checkRate(const LoadedEdl& edl) const
         faster
             ? "shows " + std::to_string(edl.shown.framesPerSecond) + " fps, more than the " + label + " of the project"
             : counted(edl.events.countInvalidTimecodes(), "event") + " with timecodes that don't exist at " + label;
-    const Failure failure{edl.path, where ? what + ", first in " + quoted(*where) : what, m_options.rateAdvice};
-    if (m_options.strict)
-        throw failure;
-    m_terminal.warn(failure);
+    tell({edl.path, where ? what + ", first in " + quoted(*where) : what, m_options.rateAdvice});
+}
+
+void EdlLoader::checkLowerRate(const LoadedEdl& edl) const
+{
+    const Framerate project = Timecode::framerate();
+    const std::size_t timecodeCount = edl.remarks.timecodeCount;
+    const std::int32_t highestFrame = edl.remarks.highestFrame;
+    const auto shown = std::upper_bound(NominalRates.begin(), NominalRates.end(), highestFrame);
+    if (timecodeCount < FewestTimecodesForALowerRate || highestFrame == 0 || shown == NominalRates.end() ||
+        *shown >= project.framesPerSecond)
+        return;
+    tell({edl.path,
+          "shows " + std::to_string(*shown) + " fps in all of its " + std::to_string(timecodeCount) +
+              " timecodes, less than the " + ProjectFramerate::labelOf(project) + " of the project",
+          m_options.rateAdvice});
+}
+
+void EdlLoader::checkDropFrame(const LoadedEdl& edl) const
+{
+    const Framerate project = Timecode::framerate();
+    const std::optional<SourceLine>& line = edl.remarks.dropFrameLine;
+    const std::int32_t state = edl.remarks.dropFrame;
+    if (!line || state == project.dropFrame)
+        return;
+    tell({edl.path,
+          std::string("is of ") + (state == 1 ? "drop-frame" : "non-drop") + " timecode, unlike the " +
+              ProjectFramerate::labelOf(project) + " of the project; " + quoted(*line),
+          m_options.rateAdvice});
 }
 
 } // namespace cadrel::app

@@ -3,7 +3,9 @@
 #pragma once
 
 #include "app/edl/FileShifts.h"
+#include "app/edl/UnreadOfFile.h"
 #include "core/edl/EventList.h"
+#include "core/fileio/FileRemarks.h"
 #include "core/fileio/SourceLine.h"
 #include "core/time/Framerate.h"
 
@@ -15,6 +17,7 @@
 namespace cadrel::app {
 
 class Terminal;
+struct Failure;
 
 struct LoadOptions {
     std::string rateLabel;    ///< one of ProjectFramerate::Labels; empty: what the first file shows
@@ -33,9 +36,11 @@ struct LoadedEdl {
     core::EventList events;
     core::Framerate shown;                            ///< the rate that the file shows; may be unknown
     std::optional<core::fileio::SourceLine> rateLine; ///< the line that says so; nothing where only timecodes show it
+    core::fileio::FileRemarks remarks;
 };
 
-/// Reads EDL files one by one, each into a list of its own, and warns of those that don't fit the project's rate.
+/// Reads EDL files one by one, each into a list of its own. Warns of lines that can't be read, and of files that don't fit
+/// the project's rate.
 class EdlLoader {
 public:
     EdlLoader(const LoadOptions& options, Terminal& terminal) : m_options(options), m_terminal(terminal) {}
@@ -53,7 +58,11 @@ public:
 
 private:
     void load(LoadedEdl& edl) const;
+    void tellUnread(const LoadedEdl& edl) const;
     void checkRate(const LoadedEdl& edl) const;
+    void checkLowerRate(const LoadedEdl& edl) const;
+    void checkDropFrame(const LoadedEdl& edl) const;
+    void tell(const Failure& failure) const;
 
     LoadOptions m_options;
     Terminal& m_terminal;

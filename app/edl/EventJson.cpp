@@ -30,7 +30,7 @@ ordered_json toJson(const EventBase& event)
             {"srcOut", event.srcOut().toString()},
             {"dstIn", event.dstIn().toString()},
             {"dstOut", event.dstOut().toString()},
-            {"speed", event.motionSpeed()},
+            {"speed", event.signedSpeed()},
             {"vfx", event.vfx()},
             {"flaws", event.flaws()},
             {"edlFile", event.edlFileName()},

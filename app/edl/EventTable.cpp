@@ -64,7 +64,7 @@ std::string speedOf(const EventBase& event)
     if (!hasUsableTimecodes(event) || event.hasFlaw(EventFlaw::TimecodeRangeInvalid))
         return "--";
     std::array<char, MostCharactersOfANumber> text{};
-    std::snprintf(text.data(), text.size(), "%.2f", event.motionSpeed());
+    std::snprintf(text.data(), text.size(), "%.2f", event.signedSpeed());
     return text.data();
 }
 

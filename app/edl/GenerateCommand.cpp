@@ -14,6 +14,7 @@
 #include "app/edl/ProjectFramerate.h"
 #include "core/fileio/CmxWriter.h"
 #include "core/model/DataModel.h"
+#include "core/time/Timecode.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
@@ -29,6 +30,7 @@ namespace cadrel::app {
 
 using core::DataModel;
 using core::EventList;
+using core::Timecode;
 using core::fileio::CmxWriter;
 using nlohmann::ordered_json;
 using util::Result;
@@ -65,11 +67,10 @@ std::vector<std::string> filesOf(const std::string& path, std::size_t eventCount
 
 void saveChangeEdl(const EventList& changeEvents, const std::string& path, const std::vector<std::string>& files)
 {
-    try {
-        changeEvents.save(toWide(path));
-    } catch (const Result::Type&) {
+    using Mode = CmxWriter::FrameCountMode;
+    CmxWriter writer(Timecode::framerate().dropFrame == 1 ? Mode::DropFrame : Mode::Unsaid);
+    if (writer.write(toWide(path), changeEvents) != Result::Ok)
         throw unwritable(files);
-    }
 }
 
 /// "001" has the number 1, but isn't how a part is numbered.

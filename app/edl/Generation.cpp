@@ -20,6 +20,7 @@ namespace cadrel::app {
 using core::DataModel;
 using core::EventBase;
 using core::EventList;
+using core::FailureAnswer;
 using core::GenerationFailure;
 using core::Settings;
 using core::VfxNameMatcher;
@@ -79,14 +80,63 @@ Failure failureOf(const GenerationFailure& failed, Result::Type result, const Ge
     return {joined(inputsOf(options)), "no change EDL can be made" + reason, "check the timecodes"};
 }
 
-/// Fills the change list. Throws Failure.
-void generate(DataModel& model, const GenerationOptions& options, Terminal& terminal)
+/// Takes part in making a change EDL: tells of the events that can't be matched, and says whether to go on without them.
+class Unmatched {
+public:
+    Unmatched(const GenerationOptions& options, Terminal& terminal) : m_options(options), m_terminal(terminal) {}
+
+    FailureAnswer answer(const GenerationFailure& failed)
+    {
+        m_last = failed;
+        if (m_options.load.strict)
+            return FailureAnswer::Stop;
+        ++m_count;
+        if (m_texts.size() == MostKept)
+            return FailureAnswer::PassOver;
+        Failure failure = failureOf(failed, Result::OutOfRange, m_options);
+        m_texts.push_back(failure.file + ": " + failure.problem);
+        failure.problem += ", so it is passed over";
+        if (m_count <= MostTold)
+            m_terminal.warn(failure);
+        return FailureAnswer::PassOver;
+    }
+
+    /// What the last failure means when it has stopped the work.
+    Failure failureFor(Result::Type result) const { return failureOf(m_last, result, m_options); }
+
+    void tellRest() const
+    {
+        if (m_count > MostTold)
+            m_terminal.warn({joined(inputsOf(m_options)),
+                             counted(m_count - MostTold, "more event") + " can't be matched and " +
+                                 (m_count == MostTold + 1 ? "is" : "are") + " passed over",
+                             "correct the timecodes"});
+    }
+
+    std::vector<std::string> release() { return std::move(m_texts); }
+
+private:
+    static constexpr std::size_t MostTold = 10;
+    static constexpr std::size_t MostKept = 1000;
+
+    const GenerationOptions& m_options;
+    Terminal& m_terminal;
+    GenerationFailure m_last;
+    std::size_t m_count = 0;
+    std::vector<std::string> m_texts;
+};
+
+/// Fills the change list; returns what it was made without. Throws Failure.
+std::vector<std::string> generate(DataModel& model, const GenerationOptions& options, Terminal& terminal)
 {
     terminal.showProgress("generating the change EDL");
-    GenerationFailure failed;
-    const Result::Type result = model.generateChangeEdl([&](const GenerationFailure& failure) { failed = failure; });
+    Unmatched unmatched(options, terminal);
+    const Result::Type result =
+        model.generateChangeEdl([&](const GenerationFailure& failed) { return unmatched.answer(failed); });
     if (result != Result::Ok)
-        throw failureOf(failed, result, options);
+        throw unmatched.failureFor(result);
+    unmatched.tellRest();
+    return unmatched.release();
 }
 
 } // namespace
@@ -115,19 +165,20 @@ void configure(Settings& settings, const GivenSettings& given)
 
 namespace {
 
-std::vector<std::string> takeEvents(std::list<LoadedEdl> edls, EventList& events)
+ReadFiles takeEvents(std::list<LoadedEdl> edls, EventList& events)
 {
-    std::vector<std::string> names;
+    ReadFiles read;
     for (LoadedEdl& edl : edls) {
         EdlLoader::refuseUnreadable(edl);
         events.append(edl.events.release());
-        names.push_back(fileNameOf(edl.path));
+        read.names.push_back(fileNameOf(edl.path));
+        read.unread.push_back({fileNameOf(edl.path), std::move(edl.remarks.unreadLines)});
     }
-    return names;
+    return read;
 }
 
-std::vector<std::string> loadCut(const std::vector<std::string>& files, EventList& events, const LoadOptions& options,
-                                 Terminal& terminal)
+ReadFiles loadCut(const std::vector<std::string>& files, EventList& events, const LoadOptions& options,
+                  Terminal& terminal)
 {
     std::list<LoadedEdl> edls = EdlLoader(options, terminal).load(files);
     requireParted(edls, options.refusesSameTimecodes || options.strict, terminal);
@@ -136,7 +187,7 @@ std::vector<std::string> loadCut(const std::vector<std::string>& files, EventLis
 
 } // namespace
 
-std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)
+ReadFiles loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, EventList& events)
 {
     return takeEvents(loader.load(files), events);
 }
@@ -145,14 +196,19 @@ Cuts loadCuts(DataModel& model, const GenerationOptions& options, Terminal& term
 {
     LoadOptions load = options.load;
     load.shifts = FileShifts(options.shifts, inputsOf(options));
-    return {loadCut(options.oldFiles, model.oldEdl(), load, terminal),
-            loadCut(options.newFiles, model.newEdl(), load, terminal)};
+    ReadFiles oldFiles = loadCut(options.oldFiles, model.oldEdl(), load, terminal);
+    ReadFiles newFiles = loadCut(options.newFiles, model.newEdl(), load, terminal);
+    return {std::move(oldFiles.names),
+            std::move(newFiles.names),
+            std::move(oldFiles.unread),
+            std::move(newFiles.unread),
+            {}};
 }
 
 Cuts generateChangeEdl(DataModel& model, const GenerationOptions& options, Terminal& terminal)
 {
-    const Cuts cuts = loadCuts(model, options, terminal);
-    generate(model, options, terminal);
+    Cuts cuts = loadCuts(model, options, terminal);
+    cuts.unmatched = generate(model, options, terminal);
     return cuts;
 }
 

@@ -26,10 +26,19 @@ struct GenerationOptions {
     std::vector<std::string> shifts; ///< for FileShifts
 };
 
-/// The names of the files that were read.
+/// The names of the files that were read, and what was told of them.
 struct Cuts {
     std::vector<std::string> oldNames;
     std::vector<std::string> newNames;
+    std::vector<UnreadOfFile> oldUnread;
+    std::vector<UnreadOfFile> newUnread;
+    std::vector<std::string> unmatched; ///< the events that the change EDL was made without, and why; the first of many
+};
+
+/// The same of one list.
+struct ReadFiles {
+    std::vector<std::string> names;
+    std::vector<UnreadOfFile> unread;
 };
 
 /// The files of both cuts.
@@ -39,13 +48,13 @@ std::vector<std::string> inputsOf(const GenerationOptions& options);
 /// can't be one.
 void configure(core::Settings& settings, const GivenSettings& given);
 
-/// Puts the events of the files into the list; returns the names of the files. Throws Failure.
-std::vector<std::string> loadEvents(const EdlLoader& loader, const std::vector<std::string>& files,
-                                    core::EventList& events);
+/// Puts the events of the files into the list. Throws Failure.
+ReadFiles loadEvents(const EdlLoader& loader, const std::vector<std::string>& files, core::EventList& events);
 
 /// Reads both cuts into the model. Throws Failure, and UsageError for a shift that can't be one.
 Cuts loadCuts(core::DataModel& model, const GenerationOptions& options, Terminal& terminal);
-/// Reads both cuts into the model and makes the change EDL by its settings, which may be empty. Throws as `loadCuts`.
+/// Reads both cuts into the model and makes the change EDL by its settings, which may be empty. Events that can't be matched
+/// are told and passed over, unless warnings are failures. Throws as `loadCuts`.
 Cuts generateChangeEdl(core::DataModel& model, const GenerationOptions& options, Terminal& terminal);
 /// Throws Failure when nothing survives.
 void requireChangeEvents(const core::DataModel& model, const GenerationOptions& options);

@@ -10,6 +10,7 @@
 #include "core/model/DataModel.h"
 #include "core/time/Timecode.h"
 
+#include <algorithm>
 #include <unordered_set>
 #include <utility>
 
@@ -24,6 +25,15 @@ using nlohmann::ordered_json;
 
 namespace {
 
+/// What was read, and what couldn't be.
+ordered_json sideToJson(const EventList& events, const std::vector<std::string>& names,
+                        const std::vector<UnreadOfFile>& unread)
+{
+    ordered_json side = describeEventsAsJson(events, names);
+    side["unread"] = app::toJson(unread);
+    return side;
+}
+
 /// "93.6".
 std::string percentOf(const Coverage& coverage)
 {
@@ -33,12 +43,15 @@ std::string percentOf(const Coverage& coverage)
 
 } // namespace
 
-std::string describeEvents(const EventList& events, const std::vector<std::string>& names)
+std::string describeEvents(const EventList& events, const std::vector<std::string>& names, std::size_t unreadLines)
 {
     const std::size_t invalid = events.countInvalid();
+    const auto reversed = std::ranges::count_if(events.events(), [](const auto& event) { return event->isReversed(); });
     const std::string title = names.empty() ? "" : toPrintable(joined(names)).text + ": ";
     return title + counted(events.size(), "event") + ", " +
-           (invalid == 0 ? "all valid" : std::to_string(invalid) + " invalid");
+           (invalid == 0 ? "all valid" : std::to_string(invalid) + " invalid") +
+           (reversed == 0 ? "" : ", " + std::to_string(reversed) + " reversed") +
+           (unreadLines == 0 ? "" : ", " + counted(unreadLines, "line") + " not read");
 }
 
 ordered_json describeEventsAsJson(const EventList& events, const std::vector<std::string>& names)
@@ -72,8 +85,8 @@ GenerationReport::GenerationReport(const DataModel& model, const EventList& carr
 
 std::string GenerationReport::cutsText(const std::string& rate) const
 {
-    return "Old cut     " + describeEvents(m_model.oldEdl(), m_cuts.oldNames) + "\n" + //
-           "New cut     " + describeEvents(m_model.newEdl(), m_cuts.newNames) + "\n" + //
+    return "Old cut     " + describeEvents(m_model.oldEdl(), m_cuts.oldNames, countOf(m_cuts.oldUnread)) + "\n" + //
+           "New cut     " + describeEvents(m_model.newEdl(), m_cuts.newNames, countOf(m_cuts.newUnread)) + "\n" + //
            "Frame rate  " + rate + "\n";
 }
 
@@ -112,8 +125,9 @@ ordered_json GenerationReport::toJson() const
                            {"shot", insert.shot},
                            {"moreShots", insert.moreShots}});
     }
-    return {{"old", describeEventsAsJson(m_model.oldEdl(), m_cuts.oldNames)},
-            {"new", describeEventsAsJson(m_model.newEdl(), m_cuts.newNames)},
+    return {{"old", sideToJson(m_model.oldEdl(), m_cuts.oldNames, m_cuts.oldUnread)},
+            {"new", sideToJson(m_model.newEdl(), m_cuts.newNames, m_cuts.newUnread)},
+            {"unmatched", m_cuts.unmatched},
             {"healed", {{"events", m_healedEvents}, {"members", m_healedMembers}}},
             {"programmeFrames", m_coverage.programmeFrames},
             {"coveredFrames", m_coverage.coveredFrames},

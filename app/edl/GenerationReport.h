@@ -6,6 +6,7 @@
 #include "app/edl/Generation.h"
 #include "core/time/Framerate.h"
 
+#include <cstddef>
 #include <nlohmann/json.hpp>
 #include <string>
 #include <vector>
@@ -30,7 +31,8 @@ public:
     /// "Change EDL" and "Covered".
     std::string changeText() const;
     std::string insertsText() const;
-    /// {"old": {...}, "new": {...}, "healed": {...}, "programmeFrames": ..., "coveredFrames": ..., "inserts": [...]}
+    /// {"old": {...}, "new": {...}, "unmatched": [...], "healed": {...}, "programmeFrames": ..., "coveredFrames": ...,
+    /// "inserts": [...]}
     nlohmann::ordered_json toJson() const;
 
 private:
@@ -46,8 +48,9 @@ private:
     Coverage m_coverage;
 };
 
-/// The names of EDL files and what is in them: "a.edl, b.edl: 12 events, all valid".
-std::string describeEvents(const core::EventList& events, const std::vector<std::string>& names);
+/// The names of EDL files and what is in them: "a.edl, b.edl: 12 events, all valid, 1 reversed, 2 lines not read".
+std::string describeEvents(const core::EventList& events, const std::vector<std::string>& names,
+                           std::size_t unreadLines = 0);
 /// The same as {"files": [...], "events": ..., "invalid": ...}.
 nlohmann::ordered_json describeEventsAsJson(const core::EventList& events, const std::vector<std::string>& names);
 

@@ -35,7 +35,9 @@ struct Totals {
     std::size_t invalid = 0;
     std::array<std::size_t, 3> byTransition{}; ///< by TransitionType
     std::size_t retimed = 0;                   ///< of the valid events
-    std::optional<Timecode> start;             ///< of the valid events
+    std::size_t reversed = 0;                  ///< of the retimed events
+    std::size_t unreadLines = 0;
+    std::optional<Timecode> start; ///< of the valid events
     std::optional<Timecode> end;
 
     void count(const EventBase& event)
@@ -46,7 +48,8 @@ struct Totals {
             ++invalid;
             return;
         }
-        retimed += event.isNormalSpeed() ? 0U : 1U;
+        retimed += event.isNormalSpeed() && !event.isReversed() ? 0U : 1U;
+        reversed += event.isReversed() ? 1U : 0U;
         if (!start || event.dstIn() < *start)
             start = event.dstIn();
         if (!end || event.dstOut() > *end)
@@ -60,17 +63,21 @@ Totals totalsOf(const std::list<LoadedEdl>& edls)
     for (const LoadedEdl& edl : edls) {
         for (const auto& event : edl.events.events())
             totals.count(*event);
+        totals.unreadLines += edl.remarks.unreadLines.size();
     }
     return totals;
 }
 
 std::string toText(const Totals& totals, const std::string& rate)
 {
-    std::string text = "Events      " + std::to_string(totals.events) + ", " +
-                       (totals.invalid == 0 ? "all valid" : std::to_string(totals.invalid) + " invalid") + "\n" +
-                       "            " + counted(totals.byTransition[0], "cut") + ", " +
-                       counted(totals.byTransition[1], "dissolve") + ", " + counted(totals.byTransition[2], "wipe") +
-                       ", " + std::to_string(totals.retimed) + " retimed\n";
+    std::string text =
+        "Events      " + std::to_string(totals.events) + ", " +
+        (totals.invalid == 0 ? "all valid" : std::to_string(totals.invalid) + " invalid") + "\n" + "            " +
+        counted(totals.byTransition[0], "cut") + ", " + counted(totals.byTransition[1], "dissolve") + ", " +
+        counted(totals.byTransition[2], "wipe") + ", " + std::to_string(totals.retimed) + " retimed" +
+        (totals.reversed == 0 ? "" : ", " + std::to_string(totals.reversed) + " of them reversed") + "\n";
+    if (totals.unreadLines > 0)
+        text += "Not read    " + counted(totals.unreadLines, "line") + "\n";
     const auto timecodeText = [](const Timecode& timecode) {
         return onScreen(timecode.toString(), Timecode::framerate());
     };
@@ -91,13 +98,16 @@ std::vector<std::shared_ptr<EventBase>> allEvents(const std::list<LoadedEdl>& ed
 void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const std::string& path)
 {
     std::vector<std::string> names;
-    for (const LoadedEdl& edl : edls)
+    std::vector<UnreadOfFile> unread;
+    for (const LoadedEdl& edl : edls) {
         names.push_back(fileNameOf(edl.path));
+        unread.push_back({names.back(), edl.remarks.unreadLines});
+    }
     std::optional<Interruption> interruption;
     if (!Output::isStandardOutput(path))
         interruption.emplace();
     Output json(path);
-    EventJson::write(allEvents(edls), {{"files", names}, {"rate", rate}},
+    EventJson::write(allEvents(edls), {{"files", names}, {"rate", rate}, {"unread", toJson(unread)}},
                      [&json](std::string_view text) { json.write(text); });
     json.place();
 }

@@ -28,10 +28,30 @@ std::optional<Framerate> ProjectFramerate::fromShownRate(const Framerate& shown)
     return Framerate(shown.framesPerSecond, shown.dropFrame == 1 ? 1 : 0);
 }
 
+Framerate ProjectFramerate::fromLabel(std::string_view label)
+{
+    if (label == "47.95 fps")
+        return {48, true, 0};
+    if (label == "48 fps")
+        return {48, false, 0};
+    if (label == "50 fps")
+        return {50, false, 0};
+    return Framerate::fromLabel(label);
+}
+
+std::optional<std::string> ProjectFramerate::labelMeant(std::string_view text)
+{
+    for (const std::string& label : {std::string(text), std::string(text) + " fps"}) {
+        if (std::find(Labels.begin(), Labels.end(), label) != Labels.end())
+            return label;
+    }
+    return std::nullopt;
+}
+
 std::string ProjectFramerate::labelOf(const Framerate& framerate)
 {
     const auto label = std::find_if(Labels.begin(), Labels.end(), [&framerate](std::string_view candidate) {
-        const Framerate other = Framerate::fromLabel(candidate);
+        const Framerate other = fromLabel(candidate);
         return other.framesPerSecond == framerate.framesPerSecond && other.pulledDown == framerate.pulledDown &&
                other.dropFrame == framerate.dropFrame;
     });

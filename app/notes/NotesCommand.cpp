@@ -77,7 +77,8 @@ void runNotes(const NotesOptions& options, Terminal& terminal)
     terminal.showProgress("comparing the cuts");
     const ChangeNotes notes(model.oldEdl(), model.newEdl(), rulesFrom(model.settings(), framerate.getFramerate()),
                             options.simplify);
-    model.generateChangeEdl(); // leaves none where it fails, and there is nothing to tell of healing then
+    // Only what was healed is told of it. The notes themselves leave no event out.
+    model.generateChangeEdl([](const core::GenerationFailure&) { return core::FailureAnswer::PassOver; });
     const NotesDocument document{notes,
                                  model.oldEdl(),
                                  model.newEdl(),

@@ -192,7 +192,7 @@ private:
                 {"clip", shot->clipName()},
                 {"srcIn", shot->srcIn().toString()},
                 {"srcOut", shot->srcOut().toString()},
-                {"speed", shot->motionSpeed()},
+                {"speed", shot->signedSpeed()},
                 {"transition", shot->transitionType() == core::TransitionType::Wipe ? "wipe"
                                : shot->isTransition()                               ? "dissolve"
                                                                                     : "cut"},

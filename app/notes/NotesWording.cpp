@@ -237,7 +237,7 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     case ChangeKind::Doubled:
         return {"once more " + length, name, "stood once in the old cut" + oldPlace()};
     case ChangeKind::Retimed:
-        return {"speed " + percent(change.oldShot->motionSpeed()) + " now " + percent(change.newShot->motionSpeed()) +
+        return {"speed " + percent(change.oldShot->signedSpeed()) + " now " + percent(change.newShot->signedSpeed()) +
                     " %",
                 name,
                 {}};
@@ -315,7 +315,8 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
 std::string NotesWording::cutText(bool isNew) const
 {
     return describeEvents(isNew ? m_document.newEvents : m_document.oldEvents,
-                          isNew ? m_document.cuts.newNames : m_document.cuts.oldNames);
+                          isNew ? m_document.cuts.newNames : m_document.cuts.oldNames,
+                          countOf(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread));
 }
 
 std::string NotesWording::nameOf(const EventBase* shot)

@@ -183,6 +183,8 @@ private:
     util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                   std::uint32_t options);
     util::Result::Type finishPreview(const EntryName& name);
+    /// Tells the user when his lock has kept the new video from its track.
+    static void tellOfVideo(bool isWritten);
     /// The frame of a run or preview of so many events around its transaction.
     util::Result::Type withProgress(const Appearance& appearance, std::size_t eventCount,
                                     const std::function<void()>& work);

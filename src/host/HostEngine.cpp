@@ -154,7 +154,6 @@ Result::Type Host::applyVirginTerritories(core::CutList& cuts)
     const Result::Type result = CadrelerBase::applyVirginTerritories(cuts);
     if (result != Result::Ok || !m_currentProject)
         return result;
-    // A preview is cleared again, and what it would leave at its end would stay.
     m_currentProject->holdAutomation(openTransaction(), cuts, m_served == core::ActionChangeContext::Run);
     if (!m_currentProject->model().settings().createVirginTerritories())
         return result;

@@ -156,6 +156,7 @@ Result::Type Host::runCadrel()
     const core::EventList& changeList = project.model().changeEdl();
     return withProgress({L"Processing Project", true}, changeList.size(), [&] {
         Counted<IActionManager> actions; // once the user has cancelled
+        bool isVideoWritten = true;
         const Result::Type result = edit(Apply, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle);
@@ -168,7 +169,7 @@ Result::Type Host::runCadrel()
             }
             requireSuccess(ran);
             project.createVideoTracks(transaction);
-            m_videoProvider->apply(true, transaction, 0.0);
+            isVideoWritten = m_videoProvider->apply(true, transaction, 0.0);
             double start = 0.0;
             double end = 0.0;
             project.getApplyRange(start, end);
@@ -180,6 +181,7 @@ Result::Type Host::runCadrel()
             takeBack(*actions);
             throw Result::Cancelled;
         }
+        tellOfVideo(isVideoWritten);
     });
 }
 
@@ -190,6 +192,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
         return Result::NoProject;
     Project& project = *m_currentProject;
     return withProgress({L"Project Preview", false}, events.size(), [&] {
+        bool isVideoWritten = true;
         requireSuccess(edit(Preview, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle, m_modelSnapshot);
@@ -197,13 +200,14 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
             project.createMarkerTracks(transaction);
             requireSuccess(CadrelerBase::startPreview(events, first, last, options));
             const double offset = project.previewOffset();
-            m_videoProvider->apply(true, transaction, offset);
+            isVideoWritten = m_videoProvider->apply(true, transaction, offset);
             // Without material in the preview the project ends before it.
             joinPieces(offset, std::max(offset, project.projectEnd()));
             project.previewEvents().copyFrom(events);
         }));
         project.collectLockTracks();
         requireSuccess(cycleToEvents(events, first, last, options));
+        tellOfVideo(isVideoWritten);
     });
 }
 
@@ -224,6 +228,12 @@ Result::Type Host::finishPreview(const EntryName& name)
         requireSuccess(CadrelerBase::endPreview());
         project.resetPreviewOffset();
     });
+}
+
+void Host::tellOfVideo(bool isWritten)
+{
+    if (!isWritten)
+        showAlert(L"The track of the new video is locked. The new video hasn't been written.");
 }
 
 Result::Type Host::withProgress(const Appearance& appearance, std::size_t eventCount, const std::function<void()>& work)

@@ -10,7 +10,42 @@ namespace Velmark {
 
 class IPlugView;
 
-/// A rectangle in pixels; right and bottom lie outside.
+/// The kinds of native parents: the `type` of IPlugView::attached.
+struct ParentType {
+    /// A window of the X Window System, whose number is passed in place of the pointer.
+    static constexpr const char* X11Window = "X11Window";
+};
+
+/// The keys without a character: the `virtualKey` of IPlugView::onKeyDown and onKeyUp, which is 0
+/// for all others.
+struct VirtualKey {
+    static constexpr int32 Backspace = 1;
+    static constexpr int32 Tab = 2;
+    static constexpr int32 Return = 3;
+    static constexpr int32 Escape = 4;
+    static constexpr int32 Insert = 5;
+    static constexpr int32 Delete = 6;
+    static constexpr int32 Home = 7;
+    static constexpr int32 End = 8;
+    static constexpr int32 PageUp = 9;
+    static constexpr int32 PageDown = 10;
+    static constexpr int32 Left = 11;
+    static constexpr int32 Right = 12;
+    static constexpr int32 Up = 13;
+    static constexpr int32 Down = 14;
+    /// F2 to F12 follow.
+    static constexpr int32 F1 = 15;
+    static constexpr int32 F12 = F1 + 11;
+};
+
+/// The modifier keys that are held, as bits: the `modifiers` of IPlugView::onKeyDown and onKeyUp.
+struct KeyModifier {
+    static constexpr int32 Shift = 1;
+    static constexpr int32 Control = 2;
+    static constexpr int32 Alt = 4;
+};
+
+/// A rectangle in physical pixels; right and bottom lie outside.
 struct ViewRect {
     int32 left = 0;
     int32 top = 0;

@@ -16,21 +16,15 @@ namespace {
 /// Values of a curve that are closer than this are the same.
 constexpr double SameValue = 1e-9;
 
-/// A point that only holds a curve at the edge of a range. It goes again as soon as another edit of a range finds that it
-/// changes nothing, which no point that somebody has set does. The difference isn't stored with the project.
-class HoldingPoint : public Implements<HoldingPoint, AutomationPoint> {
-public:
-    static constexpr const char* ClassName = "HoldingPoint";
-};
-
 bool isHoldingPoint(const Counted<AutomationPoint>& point)
 {
-    return dynamic_cast<const HoldingPoint*>(point.get()) != nullptr;
+    return point && point->isHolding();
 }
 
 Counted<AutomationPoint> makeHoldingPoint(double time, double value)
 {
-    auto point = makeCounted<HoldingPoint>();
+    auto point = makeCounted<AutomationPoint>();
+    point->setHolding(true);
     point->setSpan(time, time);
     point->setValue(value);
     return point;
@@ -38,8 +32,8 @@ Counted<AutomationPoint> makeHoldingPoint(double time, double value)
 
 Counted<AutomationPoint> copyOf(const Counted<AutomationPoint>& point, double time)
 {
-    Counted<AutomationPoint> copy =
-        isHoldingPoint(point) ? makeCounted<HoldingPoint>() : makeCounted<AutomationPoint>();
+    auto copy = makeCounted<AutomationPoint>();
+    copy->setHolding(point->isHolding());
     copy->setSpan(time, time);
     copy->setValue(point->value());
     copy->setName(point->name());
@@ -98,10 +92,6 @@ void leaveOutIfNeedless(CurvePoints& run, const Counted<AutomationPoint>& point)
     if (isNeedless(before, *point, behind))
         run.erase(found);
 }
-
-/// In seconds. A point of a copy that is further away than this from where it was copied belongs to a preview, and not to the
-/// programme around it.
-constexpr double FarAway = 600.0;
 
 /// The first of the points in and at a range that has a value; null when none has it.
 Counted<AutomationPoint> firstWithValue(const PointsAround& around, double value)
@@ -178,7 +168,8 @@ void replaceCurve(Envelope& curve, double start, double end, const CurvePoints& 
         const auto kept = firstWithValue(around, run.front()->value());
         if (kept && run.front() == outerEnd)
             run = {outerEnd = kept};
-        else if (kept && !isHoldingPoint(kept) && run.front()->start() - kept->start() > FarAway)
+        // It may be a copy that goes one day. A range that is cleared may have been a copy itself, and leaves nothing.
+        else if (kept && !isHoldingPoint(kept) && !points.empty() && run.front() == around.behind)
             run = {outerEnd = kept, around.behind};
     }
 

@@ -23,7 +23,7 @@ class Envelope;
 //                 start            end
 //
 // Where at most one point would be left, which may be far away, the first of those in the range that had its value stays
-// where it stands.
+// where it stands, unless the range is cleared and a point after it is left.
 //
 // Points within SameInstant of an edge stand at it. Where several do, the curve outside comes to the first at the start and
 // goes on from the last at the end, and the range begins with the last and comes to the first.

@@ -45,6 +45,7 @@ inline constexpr std::string_view Curves = "curves";
 inline constexpr std::string_view Events = "events";
 inline constexpr std::string_view Automates = "automates";
 inline constexpr std::string_view Points = "points";
+inline constexpr std::string_view Holding = "holding";
 inline constexpr std::string_view Time = "time";
 inline constexpr std::string_view Value = "value";
 inline constexpr std::string_view Start = "start";
@@ -70,7 +71,7 @@ inline constexpr std::array TrackKeys{Key::Kind,       Key::Name,   Key::Locked,
 inline constexpr std::array NamelessCurveKeys{Key::Number, Key::Name, Key::Selected, Key::Attributes, Key::Points};
 inline constexpr std::array CurveKeys{Key::Number,   Key::Automates,  Key::Name,
                                       Key::Selected, Key::Attributes, Key::Points};
-inline constexpr std::array PointKeys{Key::Time, Key::Value, Key::Name, Key::Selected, Key::Attributes};
+inline constexpr std::array PointKeys{Key::Time, Key::Value, Key::Name, Key::Holding, Key::Selected, Key::Attributes};
 inline constexpr std::array EventKeys{Key::Kind, Key::Start,    Key::End,        Key::Clip,  Key::Offset,
                                       Key::Name, Key::Selected, Key::Attributes, Key::Events};
 

@@ -176,6 +176,7 @@ void ProjectReader::readPoint(const JsonMembers& members, Envelope& curve)
     const double time = timeIn(members, Key::Time);
     point->setSpan(time, time);
     point->setValue(members.number(Key::Value, 0.0, 1.0));
+    point->setHolding(members.flag(Key::Holding));
     readDetails(members, *point, PointKeys);
     point->insertInto(curve);
 }

@@ -202,6 +202,7 @@ void ProjectWriter::writePoint(const AutomationPoint& point)
     writeSeconds(Key::Time, point.start());
     writeNumber(Key::Value, point.value(), 0.0, 1.0);
     writeName(point);
+    writeFlag(Key::Holding, point.isHolding());
     writeDetails(point, PointKeys, Layout::OneLine);
     m_json.endObject();
 }

@@ -19,6 +19,11 @@ public:
     double value() const { return m_value; }
     void setValue(double value);
 
+    /// Whether it only holds the curve at the edge of a range that was edited. It goes again as soon as another edit of a
+    /// range finds that it changes nothing, which no point that somebody has set does.
+    bool isHolding() const { return m_isHolding; }
+    void setHolding(bool flag) { m_isHolding = flag; }
+
 protected:
     Extent extent() const override { return Extent::Instant; }
 
@@ -26,6 +31,7 @@ private:
     double exchangeValue(double value);
 
     double m_value = 0.0;
+    bool m_isHolding = false;
 };
 
 } // namespace standin

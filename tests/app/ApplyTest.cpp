@@ -370,7 +370,8 @@ TEST(Apply, TheReportHasTheEventsAndWhatTheCutsHold)
 
     EXPECT_EQ(report.at("project"), "scene.stage");
     EXPECT_EQ(report.at("rate"), "24 fps");
-    EXPECT_EQ(report.at("old"), (json{{"files", {"old.edl"}}, {"events", 3}, {"invalid", 0}}));
+    EXPECT_EQ(report.at("old"),
+              (json{{"files", {"old.edl"}}, {"events", 3}, {"invalid", 0}, {"unread", json::array()}}));
     EXPECT_EQ(report.at("events").size(), 2U);
     EXPECT_EQ(report.at("applied"), 2);
     EXPECT_EQ(report.at("passedOver"), json::array());
@@ -915,8 +916,8 @@ TEST(Apply, ASecondRunReplacesMarkersInAPreservedStretchAlone)
         EXPECT_EQ(
             placesOn("Destination", scene.project),
             (Places{{"Event: 1 - A001 ", {"0-10"}}, {"Event: 2 - A002 ", {"10-18"}}, {"Event: 3 - A003 ", {"22-32"}}}));
-        // The one that started in the stretch went whole, and of the new one the stretch takes its part.
-        EXPECT_EQ(placesOn("Insert", scene.project), (Places{{"Insert: B009", {"18-20"}}}));
+        // Of the new one the stretch takes its part, and of the old one what lies outside stays.
+        EXPECT_EQ(placesOn("Insert", scene.project), (Places{{"Insert: B009", {"18-20", "20-22"}}}));
     }
 }
 
@@ -953,22 +954,18 @@ TEST(Apply, EventsOfTheNewCutThatStandNowhereDoNotStopARun)
     EXPECT_EQ(markersOf(report, "Dissolve/Wipe"), Words());
 }
 
-/// How many clips of one take lie: one after the other and in sync, all on top of one another, half of them over the whole
-/// film and the others short and in its first seconds, or one after the other and each from an earlier place of the take.
-enum class Layout { InSync, Stacked, Shadowed, AtOffsets };
+/// How many clips of one take lie: one after the other and in sync, or all on top of one another.
+enum class Layout { InSync, Stacked };
 
 /// A project with one track on which so many clips of one take lie, from the first half second of the film on.
 std::string manyClips(int count, Layout layout)
 {
     std::string events;
     for (int index = 0; index < count; ++index) {
-        const double step = 29.0 * index / count;
-        const bool isLong = layout == Layout::Stacked || (layout == Layout::Shadowed && index < count / 2);
-        const double place = isLong ? 0.0 : layout == Layout::Shadowed ? step / 29.0 : step;
-        const double offset = layout == Layout::AtOffsets ? 29.0 - step : place;
-        const double length = isLong ? 29.0 : 29.0 / count;
+        const double place = layout == Layout::Stacked ? 0.0 : 29.0 * index / count;
+        const double length = layout == Layout::Stacked ? 29.0 : 29.0 / count;
         events += std::string(index == 0 ? "" : ",\n") + R"({"kind": "clip", "start": )" + number(3600.5 + place) +
-                  R"(, "end": )" + number(3600.5 + place + length) + R"(, "clip": 1, "offset": )" + number(offset) +
+                  R"(, "end": )" + number(3600.5 + place + length) + R"(, "clip": 1, "offset": )" + number(place) +
                   R"(, "name": "take"})";
     }
     std::string text = projectWith(R"({"kind": "audio", "name": "DIA", "events": [)" + events + "]}");
@@ -989,7 +986,7 @@ TEST(Apply, NoRunIsQuadraticInClipsOfOneTake)
         getrusage(RUSAGE_CHILDREN, &usage);
         return static_cast<double>(usage.ru_utime.tv_sec) + 1e-6 * static_cast<double>(usage.ru_utime.tv_usec);
     };
-    for (const Layout layout : {Layout::InSync, Layout::Stacked, Layout::Shadowed, Layout::AtOffsets}) {
+    for (const Layout layout : {Layout::InSync, Layout::Stacked}) {
         const auto secondsToApply = [&](int count) {
             const std::string project = folder.write("many.stage", manyClips(count, layout));
             const double before = secondsOfChildren();
@@ -1092,6 +1089,56 @@ TEST(Apply, AClipDecadesAfterTheFilmIsNamed)
     EXPECT_EQ(failureOf(R"({"kind": "audio", "name": "DIA", "events": [)" + near + R"(, {"kind": "clip", "start": )" +
                         far + R"(, "end": )" + later + R"(, "name": "far"}]})"),
               "the clip \"far\" on the track \"DIA\" stands at 271560:00:00:00" + remedy);
+}
+
+TEST(Apply, LinesThatCannotBeReadAreToldAndStrictWritesNothing)
+{
+    const Scene scene;
+    scene.folder.write("new.edl", newCut() + "005  A005  V  C  10:00:00:00 10:00:01:00 01:00:32:00\n");
+    const std::string what = "line 10 misses a field and isn't read: "
+                             "\"005  A005  V  C  10:00:00:00 10:00:01:00 01:00:32:00\"; "
+                             "correct the list, and save it as plain text\n";
+    const std::string before = contentOf(scene.project);
+
+    const Outcome warned = scene.apply();
+    const Outcome strict = scene.apply({"--strict", "--in-place"});
+
+    EXPECT_EQ(warned.status, 0);
+    EXPECT_EQ(warned.err, "cadrel: " + scene.newFile + ": warning: " + what);
+    EXPECT_TRUE(tells(warned.out, "New cut     new.edl: 4 events, all valid, 1 line not read\n")) << warned.out;
+    EXPECT_EQ(scene.applyAsJson().at("new").at("unread").at(0).at("line"), 10);
+    EXPECT_EQ(strict.status, 1);
+    EXPECT_EQ(strict.err, "cadrel: " + scene.newFile + ": " + what);
+    EXPECT_EQ(contentOf(scene.project), before);
+}
+
+TEST(Apply, AShotThatIsReversedNowTakesNoSoundAlong)
+{
+    const Scene scene;
+    const std::string reversal = "M2   A002       -024.0                11:00:02:12\n";
+    std::string reversed = newCut();
+    reversed.insert(reversed.find("003  B009"), reversal);
+    scene.folder.write("new.edl", reversed);
+
+    const json report = scene.applyAsJson();
+
+    for (const json& event : report.at("events"))
+        EXPECT_NE(event.at("roll"), "A002") << event;
+    EXPECT_EQ(report.at("inserts").at(0).at("dstIn"), "01:00:10:00");
+}
+
+TEST(Apply, AProjectWithReversedShotsIsKnownAgain)
+{
+    const Scene scene;
+    std::string reversed = newCut();
+    reversed.insert(reversed.find("003  B009"), "M2   A002       -024.0                11:00:02:12\n");
+    scene.folder.write("new.edl", reversed);
+    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+    const std::string next = scene.folder.write("next.edl", reversed);
+
+    const Outcome outcome = runCadrel({"apply", scene.project, "--old", scene.newFile, "--new", next, "--summary"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
 }
 
 TEST(Apply, TheProjectHasToRunAtTheRateThatIsGiven)

@@ -94,7 +94,9 @@ TEST(BadInput, AFileWithoutEvents)
     expectRefused(folder.write("empty.edl", ""), "holds no events; give a CMX EDL");
     expectRefused(folder.write("title.edl", "TITLE: REEL 3\nFCM: NON-DROP FRAME\n* A COMMENT\n"),
                   "holds no events; give a CMX EDL");
-    expectRefused(folder.write("short.edl", "001 AX V D 024 01:00:00:12\n"), "holds no events; give a CMX EDL");
+    expectRefused(folder.write("short.edl", "001 AX V D 024 01:00:00:12\n"),
+                  "holds no event that can be read; line 1 misses a field and isn't read: "
+                  "\"001 AX V D 024 01:00:00:12\"; correct the list, and save it as plain text");
 }
 
 TEST(BadInput, ABinaryFile)

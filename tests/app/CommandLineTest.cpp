@@ -97,6 +97,8 @@ TEST(CommandLine, WordsOfOptionsAreChecked)
     };
 
     expectWrongUsage(with("--rate", "23 fps"), "29.97 dfps");
+    expectWrongUsage(with("--rate", "59.94 dfps"), "\"59.94 dfps\" is not supported");
+    expectWrongUsage(with("--rate", ""), "29.97 dfps");
     expectWrongUsage(with("--match", "reel"), "roll");
     expectWrongUsage(with("--heal", "all"), "inserts");
 }

@@ -150,8 +150,8 @@ TEST(Generate, JsonTellsTheEventsAndTheSummary)
         "dstIn": "01:00:10:00", "dstOut": "01:00:18:00", "speed": 1.0, "vfx": false, "flaws": [], "edlFile": "",
         "members": []})"));
     EXPECT_EQ(document.at("rate"), "24 fps");
-    EXPECT_EQ(document.at("old"), json::parse(R"({"files": ["old.edl"], "events": 3, "invalid": 0})"));
-    EXPECT_EQ(document.at("new"), json::parse(R"({"files": ["new.edl"], "events": 4, "invalid": 0})"));
+    EXPECT_EQ(document.at("old"), json::parse(R"({"files": ["old.edl"], "events": 3, "invalid": 0, "unread": []})"));
+    EXPECT_EQ(document.at("new"), json::parse(R"({"files": ["new.edl"], "events": 4, "invalid": 0, "unread": []})"));
     EXPECT_EQ(document.at("programmeFrames"), 32 * 24);
     EXPECT_EQ(document.at("coveredFrames"), 28 * 24);
     EXPECT_EQ(document.at("inserts"), json::parse(R"([{"dstIn": "01:00:18:00", "dstOut": "01:00:22:00",
@@ -385,7 +385,10 @@ TEST(Generate, AllButAFrameIsNotAHundredPercent)
     EXPECT_NE(film.generate().out.find("Covered     00:06:39:23 of 00:06:40:00, 99.9 %\n"), std::string::npos);
 }
 
-TEST(Generate, AFailureNamesBothEventsThatCantBeMatched)
+const std::string OutsideOfTheDay = ": a time would fall outside the 24 hours of a day";
+const std::string CorrectTimecodes = "; correct its timecodes or leave it out\n";
+
+TEST(Generate, TwoEventsThatCantBeMatchedAreToldAndPassedOver)
 {
     // 2512 frames of source fill 2500 frames of programme up to the last frame of the day: the speed counts as normal,
     // so that the stretch is taken to be as long as the source and would end behind midnight.
@@ -393,31 +396,57 @@ TEST(Generate, AFailureNamesBothEventsThatCantBeMatched)
     const std::string fine = cut("001", "A001", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
     const Film film(fine + cut("002", "A002", "10:00:00:00 10:00:10:00", "01:00:10:00 01:00:20:00") + speedy,
                     fine + speedy);
+    const std::string what = "event 3 in line 2 of new.edl (A009) can't be matched with event 3 in line 3 of old.edl "
+                             "(A009)" +
+                             OutsideOfTheDay;
 
     const Outcome outcome = film.generate({"-o", film.folder / "change.edl"});
+    const Outcome strict = film.generate({"--strict"});
 
-    EXPECT_EQ(outcome.status, 1);
-    EXPECT_EQ(outcome.out, "");
-    EXPECT_EQ(outcome.err,
-              "cadrel: new.edl: event 3 in line 2 of new.edl (A009) can't be matched with event 3 in line 3 of old.edl "
-              "(A009): "
-              "a time would fall outside the 24 hours of a day; correct its timecodes or leave it out\n");
-    EXPECT_EQ(film.folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.err, "cadrel: new.edl: warning: " + what + ", so it is passed over" + CorrectTimecodes);
+    EXPECT_EQ(contentOf(film.folder / "change.edl"),
+              "TITLE:   change.edl\n"
+              "001  A001     V     C        01:00:00:00 01:00:10:00 01:00:00:00 01:00:10:00\n");
+    EXPECT_EQ(film.generateAsJson().at("unmatched"), json::array({"new.edl: " + what}));
+    EXPECT_EQ(strict.status, 1);
+    EXPECT_EQ(strict.err, "cadrel: new.edl: " + what + CorrectTimecodes);
 }
 
-TEST(Generate, AFailureNamesTheEventThatCantBeUsed)
+TEST(Generate, AnEventThatCantBeUsedIsToldAndPassedOver)
 {
-    // A transition of 9,999,999 frames is longer than a day.
+    // A transition of 9,999,999 frames is longer than a day, and one at midnight would end after it.
     const std::string endless = "002  A009  V  D  9999999  01:00:00:00 01:00:10:12 01:00:10:00 01:00:20:12\n";
+    const std::string late = "003  A008  V  D  024  01:00:00:00 01:00:00:12 23:59:59:12 23:59:59:23\n";
     const std::string fine = cut("001", "A001", "10:00:00:00 10:00:10:12", "01:00:00:00 01:00:10:12");
+    const Film film(fine + endless, fine + late);
+    const auto what = [](const char* event) { return std::string(event) + " can't be used" + OutsideOfTheDay; };
 
-    const Film inOld(fine + endless, fine);
-    const Film inNew(fine, fine + endless + cut("003", "A003", "10:00:00:00 10:00:10:00", "01:00:30:00 01:00:40:00"));
+    const Outcome outcome = film.generate();
 
-    const std::string reason = " (A009) can't be used: a time would fall outside the 24 hours of a day; "
-                               "correct its timecodes or leave it out\n";
-    EXPECT_EQ(inOld.generate().err, "cadrel: old.edl: event 2 in line 2 of old.edl" + reason);
-    EXPECT_EQ(inNew.generate().err, "cadrel: new.edl: event 2 in line 2 of new.edl" + reason);
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.err, "cadrel: old.edl: warning: " + what("event 2 in line 2 of old.edl (A009)") +
+                               ", so it is passed over" + CorrectTimecodes +
+                               "cadrel: new.edl: warning: " + what("event 3 in line 2 of new.edl (A008)") +
+                               ", so it is passed over" + CorrectTimecodes);
+    EXPECT_NE(outcome.out.find("Change EDL  1 event\n"), std::string::npos) << outcome.out;
+    EXPECT_EQ(film.generate({"--strict"}).status, 1);
+    EXPECT_EQ(runCadrel({"notes", "--old", film.oldFile, "--new", film.newFile}).status, 0);
+}
+
+TEST(Generate, OfManyEventsThatCantBeUsedTheFirstTenAreTold)
+{
+    const std::string fine = cut("001", "A001", "10:00:00:00 10:00:10:12", "01:00:00:00 01:00:10:12");
+    std::string endless;
+    for (int count = 0; count < 11; ++count)
+        endless += "002  A009  V  D  9999999  01:00:00:00 01:00:10:12 01:00:10:00 01:00:20:12\n";
+    const Film eleven(fine + endless, fine);
+    const Film twelve(fine + endless, fine + endless.substr(0, endless.find('\n') + 1));
+
+    const std::string rest = ": warning: 1 more event can't be matched and is passed over; correct the timecodes\n";
+    EXPECT_TRUE(eleven.generate().err.ends_with(eleven.newFile + rest)) << eleven.generate().err;
+    EXPECT_NE(twelve.generate().err.find("2 more events can't be matched and are passed over"), std::string::npos);
+    EXPECT_EQ(twelve.generateAsJson().at("unmatched").size(), 12U);
 }
 
 TEST(Generate, WarningsNameTheFileAndStrictStops)

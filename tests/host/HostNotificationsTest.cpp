@@ -354,17 +354,18 @@ TEST_F(HostNotificationsTest, SaysThatASaveWentWrong)
     EXPECT_EQ(host.alerts->messages, Messages{SaveFailed});
 }
 
-TEST_F(HostNotificationsTest, LeavesNothingStoredWhereTheHostTakesNoBlock)
+TEST_F(HostNotificationsTest, LeavesWhatWasStoredWhereTheHostTakesNoBlock)
 {
     host.project.announceStoring();
     ASSERT_EQ(host.project.hasAttribute(AttributeKey::Storage), ResultOk);
     ASSERT_EQ(host.project.hasAttribute(AttributeKey::StorageChecksum), ResultOk);
     host.altered.replace(IAttributeData::iid, makeCounted<FullList>());
 
+    const std::string before = host.dump();
+
     EXPECT_EQ(host.adapter().projectStoring(host.document()), Result::HostCallFailed);
 
-    EXPECT_NE(host.project.hasAttribute(AttributeKey::Storage), ResultOk);
-    EXPECT_NE(host.project.hasAttribute(AttributeKey::StorageChecksum), ResultOk);
+    EXPECT_EQ(host.dump(), before);
     EXPECT_EQ(host.alerts->messages, Messages{SaveFailed});
 }
 

@@ -230,6 +230,25 @@ TEST_P(HostOperationsTest, StartsNothingOnTracksThatTheUserHasLocked)
     EXPECT_EQ(adapter().canStart(), Result::Ok);
 }
 
+TEST_P(HostOperationsTest, StartsNothingWhereOnlyTheMarkersOfRunsCouldBeChanged)
+{
+    const auto locked = host.addTrack(TypeWord::Audio, u"DX");
+    query<ITrackNode>(locked)->setFlag(TrackFlag::Lock, true);
+    carryOverTwo();
+    for (std::int32_t role = TrackRole::Destination; role < TrackRole::Memos; ++role) {
+        const auto markers = host.addTrack(TypeWord::Marker, u"Markers");
+        markers->setAttribute(AttributeKey::MarkerType, FVariant::integer(role), true);
+        dynamic_cast<standin::Node&>(*markers).setSelected(true);
+        EXPECT_EQ(adapter().canStart(), Result::NoTracks) << role;
+    }
+
+    const auto memos = host.addTrack(TypeWord::Marker, u"Memos");
+    memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
+    EXPECT_EQ(adapter().canStart(), Result::Ok) << "The memos are the user's.";
+    host.settings().setApplyTo(ApplyTo::SelectedTracks);
+    EXPECT_EQ(adapter().canStart(), Result::NoTracksSelected) << "The markers of runs are selected alone.";
+}
+
 TEST_P(HostOperationsTest, AnswersWhyAProjectCannotBeRunThatHasNoUsableTracks)
 {
     const auto broken = FakeProject::withoutUsableTrack();

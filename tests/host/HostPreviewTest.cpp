@@ -1199,6 +1199,29 @@ TEST_P(HostMemoTest, FollowThePreviewThatWasOnWhenTheProjectWasSaved)
     EXPECT_TRUE(host.alerts->messages.empty());
 }
 
+TEST_P(HostMemoTest, FollowTheirCopiesAlsoWhereTheTimeOriginHasMovedMeanwhile)
+{
+    for (const double moved : {10.0, 3600.0, 0.5}) {
+        SCOPED_TRACE(moved);
+        adapter().setPreviewActive(true);
+        host.preview(firstChange());
+        host.idle();
+        host.project.setTimeOrigin(host.origin + moved);
+
+        edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
+        EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 7-7", "far 30-30"}));
+
+        host.project.announceStoring();
+        host.disconnect();
+        host.connect();
+        edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(16.0)); });
+        EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 6-6", "far 30-30"}));
+
+        host.project.setTimeOrigin(host.origin);
+        adapter().setPreviewActive(false);
+    }
+}
+
 TEST_P(HostMemoTest, StayWhereTheStoredEventsOfThePreviewAreDamaged)
 {
     adapter().setPreviewActive(true);

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 // The law of a run, for random projects and films: where a change event lies, each track holds what stood at the source of
-// the instant, and elsewhere nothing, with the automation of the end of the stretch before it; what is no part of the run
-// stays as it was.
+// the instant, and elsewhere nothing, with the automation of the end of the stretch before it, and each jump that this has
+// brought about is marked; what is no part of the run stays as it was.
 
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
@@ -23,7 +23,9 @@
 #include "standin/project/Track.h"
 #include "tests/support/standin/Heard.h"
 #include "tests/support/standin/RandomProject.h"
+#include "tests/support/standin/TestHost.h"
 #include "velmark/Attributes.h"
+#include "velmark/String.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
@@ -31,7 +33,9 @@
 #include <algorithm>
 #include <array>
 #include <cmath>
+#include <cstddef>
 #include <cstdint>
+#include <iterator>
 #include <map>
 #include <memory>
 #include <optional>
@@ -161,6 +165,32 @@ public:
         const double inside = end ? edge - Hair : edge + Hair;
         const auto source = sourceOf(inside);
         return source ? std::optional(Side{*source + (end ? Hair : -Hair), end.has_value()}) : std::nullopt;
+    }
+    struct Warning {
+        double start;
+        double end;
+        std::string text;
+    };
+    /// The automation warnings of the run; nothing where the user has locked their track.
+    std::optional<std::vector<Warning>> warnings() const
+    {
+        for (standin::Track* const track : project.allTracks()) {
+            FVariant role;
+            if (track->kind() != standin::Track::Kind::Marker ||
+                track->getAttribute(AttributeKey::MarkerType, role) != ResultOk || !role.isInteger() ||
+                (role.asInteger() & 0xff) != TrackRole::AutomationWarning)
+                continue;
+            if (track->isLocked())
+                return std::nullopt;
+            std::vector<Warning> found;
+            for (const auto& marker : standin::tests::childrenOf(*track)) {
+                const std::string text = ConstString(marker->getName()).text8();
+                if (text.starts_with("Automation warning in "))
+                    found.push_back({marker->getStart(nullptr), marker->getEnd(nullptr), text.substr(21)});
+            }
+            return found;
+        }
+        return std::nullopt;
     }
     bool isRestricted() { return model().settings().restrictRange(); }
     /// Whether the run replaces what stands at the instant.
@@ -364,6 +394,80 @@ bool isStraight(const standin::Envelope& curve, double start, double end)
     });
 }
 
+struct Jump {
+    double time;
+    double from;
+    double to;
+};
+
+/// The course of a curve, apart from the project, in seconds of the host. Points that are closer than SameInstant stand at
+/// one time.
+class Course {
+public:
+    explicit Course(const standin::Envelope& curve)
+    {
+        for (const standin::AutomationPoint* point = curve.firstPoint(); point; point = curve.pointBehind(*point)) {
+            if (m_steps.empty() || point->start() - m_steps.back().time >= core::SameInstant)
+                m_steps.push_back({point->start(), point->value(), point->value()});
+            m_steps.back().to = point->value();
+        }
+    }
+
+    /// Where it has points, with what it comes to and goes on with.
+    const std::vector<Jump>& steps() const { return m_steps; }
+    /// What it comes to and goes on with at any time. Nothing for a curve without points.
+    std::optional<Jump> at(double time) const
+    {
+        if (m_steps.empty())
+            return std::nullopt;
+        const auto next = std::ranges::partition_point(
+            m_steps, [time](const Jump& step) { return time - step.time >= core::SameInstant; });
+        if (next != m_steps.end() && next->time - time < core::SameInstant)
+            return *next;
+        if (next == m_steps.begin())
+            return Jump{time, next->from, next->from};
+        const Jump& last = *std::prev(next);
+        const double value = next == m_steps.end()
+                                 ? last.to
+                                 : std::lerp(last.to, next->from, (time - last.time) / (next->time - last.time));
+        return Jump{time, value, value};
+    }
+
+private:
+    std::vector<Jump> m_steps;
+};
+
+using Courses = std::map<std::int32_t, Course>;
+
+Courses coursesOf(const standin::Track& track)
+{
+    Courses courses;
+    for (const auto& [number, curve] : track.curves())
+        courses.emplace(number, Course(*curve));
+    return courses;
+}
+
+/// A jump as large as this is surely one that can be heard, and as small as that surely none.
+constexpr double SurelyHeard = 0.0101;
+constexpr double SurelyNotHeard = 0.0099;
+
+bool isNearby(double a, double b)
+{
+    return std::abs(a - b) < SurelyHeard;
+}
+
+/// Whether the old programme has the jump of the new one at a place from which the instant was carried.
+bool wasThereBefore(RandomRun& run, const Course& old, const Jump& jump)
+{
+    constexpr double Hair = 1e-5;
+    return std::ranges::any_of(std::array{-Hair, Hair}, [&](double hair) {
+        const double beside = jump.time + hair;
+        const auto source = run.isReplaced(beside) ? run.sourceOf(beside) : std::optional(beside);
+        const auto before = source ? old.at(*source - hair) : std::nullopt;
+        return before && isNearby(before->from, jump.from) && isNearby(before->to, jump.to);
+    });
+}
+
 /// Nothing to conform is no run; the law says nothing of it.
 bool canRun(RandomRun& run)
 {
@@ -436,6 +540,48 @@ RC_GTEST_PROP(HostRunLaw, EachInstantHoldsWhatStoodAtItsSource, ())
             RC_ASSERT(isLevelFrom(*curve, EndOfFilm));
         RC_ASSERT(!hasConstantPointFrom(track, EndOfFilm));
     }
+}
+
+RC_GTEST_PROP(HostRunLaw, EachNewJumpOfTheAutomationIsMarkedAndNothingElse, ())
+{
+    standin::tests::SeededChance chance(someSeed());
+    RandomRun run(chance);
+    RC_PRE(canRun(run));
+    run.model().settings().setCreateAutomationWarningMarkers(true);
+    Tracks tracks = run.project.allTracks();
+    std::erase_if(tracks, [&](standin::Track* track) { return track->isFolder() || !run.isConformed(*track); });
+    std::map<const standin::Track*, Courses> old;
+    for (const standin::Track* const track : tracks)
+        old[track] = coursesOf(*track);
+
+    run.conform();
+
+    const std::optional<std::vector<RandomRun::Warning>> warnings = run.warnings();
+    RC_PRE(warnings.has_value());
+    std::vector<bool> isExplained(warnings->size(), false);
+    for (standin::Track* const track : tracks) {
+        const std::string name = std::string(ConstString(track->getName()).text8()) + " ";
+        for (const auto& [number, course] : coursesOf(*track)) {
+            for (const Jump& jump : course.steps()) {
+                const double size = std::abs(jump.to - jump.from);
+                if (size < SurelyNotHeard || jump.time > EndOfFilm)
+                    continue;
+                bool isMarked = false;
+                for (std::size_t index = 0; index < warnings->size(); ++index) {
+                    const RandomRun::Warning& warning = (*warnings)[index];
+                    if (warning.start - 1e-4 < jump.time && jump.time < warning.end + 1e-4 &&
+                        warning.text.find(name) != std::string::npos) {
+                        isMarked = true;
+                        isExplained[index] = true;
+                    }
+                }
+                const auto course0 = old.at(track).find(number);
+                RC_ASSERT(isMarked || size < SurelyHeard ||
+                          (course0 != old.at(track).end() && wasThereBefore(run, course0->second, jump)));
+            }
+        }
+    }
+    RC_ASSERT(std::ranges::all_of(isExplained, [](bool flag) { return flag; }));
 }
 
 RC_GTEST_PROP(HostRunLaw, UndoAndRedoLeadToTheSameBytes, ())

@@ -419,6 +419,24 @@ TEST_P(HostRunTest, WritesTheNewPictureAtItsPlace)
     EXPECT_DOUBLE_EQ(events[0]->getEnd(nullptr), host.inHost(9.0));
 }
 
+TEST_P(HostRunTest, TellsThatTheNewPictureIsNotWrittenOnATrackThatTheUserHasLocked)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:00:00"), core::Timecode("00:00:20:00")),
+        false);
+    host.conform();
+    EXPECT_TRUE(host.alerts->messages.empty());
+    query<ITrackNode>(host.trackNamed(u"New Video"))->setFlag(TrackFlag::Lock, true);
+
+    host.conform();
+
+    const Entries told{u"The track of the new video is locked. The new video hasn't been written."};
+    EXPECT_EQ(host.alerts->messages, told);
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(host.alerts->messages.size(), 2U);
+}
+
 TEST_P(HostRunTest, LetsTheAutomationRunStraightOverWhatNothingCovers)
 {
     host.model().changeEdl().clear();
@@ -495,6 +513,31 @@ TEST_P(HostRunTest, AMuteAtTheEndOfTheReelDoesNotReachBackIntoAnInsertOfAPreview
         EXPECT_NEAR(curve.valueBehind(offset + host.inHost(time)).value_or(-1.0), 0.5, 1e-6) << time;
     ASSERT_TRUE(host.undo());
     EXPECT_EQ(standin::tests::childrenOf(*host.curveOf(track, volume)).size(), 3U);
+}
+
+TEST_P(HostRunTest, APreviewHoldsTheAutomationAfterItsEndAsARunDoes)
+{
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00");
+    host.addPoint(track, volume, host.inHost(1.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(19.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(19.0), 0.0F);
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(track, volume));
+    const auto isHeld = [&](double place) {
+        for (const double time : {4.0, 5.5, 19.5, 30.0, 3600.0})
+            EXPECT_NEAR(curve.valueBehind(place + host.inHost(time)).value_or(-1.0), 0.5, 1e-6) << time;
+    };
+    const auto points = [&] { return standin::tests::childrenOf(*host.curveOf(track, volume)).size(); };
+    host.adapter().setPreviewActive(true);
+
+    host.preview(host.model().changeEdl());
+    isHeld(host.adapter().getRunState().previewOffset);
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(points(), 3U) << "Nothing of it stays.";
+
+    host.conform();
+    isHeld(0.0);
 }
 
 TEST_P(HostRunTest, KeepsTheAutomationThatALaterEventBringsBetweenTwo)

@@ -7,7 +7,10 @@
 #include "core/edl/EventBase.h"
 #include "util/Result.h"
 
+#include <algorithm>
 #include <cstdint>
+#include <deque>
+#include <iterator>
 #include <memory>
 
 namespace cadrel::core {
@@ -43,6 +46,43 @@ ChangeCandidate makeCandidate(const Placement& placement, const EventBase& newEv
             timecode(stretch.newSourceEnd())};
 }
 
+/// The twins of a group whose stretch stays within the day.
+class TwinsWithinDay {
+public:
+    TwinsWithinDay(const TwinGroup& all, const EventShape& newEvent, const Framerate& framerate) : m_group(all)
+    {
+        const auto isWithinDay = [&](const TwinGroup::Place& place) {
+            try {
+                SharedStretch({all.shape, {&place, 1}, {&place, 1}, true}, newEvent, framerate);
+                return true;
+            } catch (Result::Type) {
+                return false;
+            }
+        };
+        // The later a twin stands, the later its stretch ends.
+        const auto end = std::partition_point(all.placesByTime.begin(), all.placesByTime.end(), isWithinDay);
+        const auto count = static_cast<std::size_t>(end - all.placesByTime.begin());
+        m_group.placesByTime = all.placesByTime.first(count);
+        if (all.areOrdersEqual || count == 0) {
+            m_group.placesByIndex = all.placesByIndex.first(count);
+            return;
+        }
+        const std::int32_t latest = m_group.placesByTime.back().dstIn;
+        std::ranges::copy_if(all.placesByIndex, std::back_inserter(m_placesByIndex),
+                             [latest](const TwinGroup::Place& place) { return place.dstIn <= latest; });
+        m_group.placesByIndex = m_placesByIndex;
+    }
+    TwinsWithinDay(const TwinsWithinDay&) = delete;
+    TwinsWithinDay& operator=(const TwinsWithinDay&) = delete;
+
+    bool areNone() const { return m_group.placesByTime.empty(); }
+    const TwinGroup& group() const { return m_group; }
+
+private:
+    TwinGroup m_group;
+    std::vector<TwinGroup::Place> m_placesByIndex;
+};
+
 } // namespace
 
 void CandidateSearch::addOldEvent(const std::string& name, const EventBase& event, std::size_t index)
@@ -52,10 +92,11 @@ void CandidateSearch::addOldEvent(const std::string& name, const EventBase& even
 
 std::vector<ChangeCandidate>
 CandidateSearch::survivingCandidates(const std::string& name, const EventBase& newEvent, double lastDisplacement,
-                                     const std::function<void(std::size_t)>& onFailure) const
+                                     const std::function<FailureAnswer(std::size_t)>& onFailure) const
 {
     const EventShape shape(newEvent, m_framerate);
     std::vector<SharedStretch> stretches;
+    std::deque<TwinsWithinDay> parts;
     for (const TwinGroup* group : m_index.groupsOverlapping(name, shape.srcIn, shape.srcOut)) {
         if (!group->shape.isPlayedLike(shape))
             continue;
@@ -63,8 +104,11 @@ CandidateSearch::survivingCandidates(const std::string& name, const EventBase& n
             stretches.emplace_back(*group, shape, m_framerate);
         } catch (Result::Type) {
             // The latest place leaves the day first.
-            onFailure(group->placesByTime.back().index);
-            throw;
+            if (onFailure(group->placesByTime.back().index) == FailureAnswer::Stop)
+                throw;
+            const TwinsWithinDay& rest = parts.emplace_back(*group, shape, m_framerate);
+            if (!rest.areNone())
+                stretches.emplace_back(rest.group(), shape, m_framerate);
         }
     }
     std::vector<ChangeCandidate> candidates;

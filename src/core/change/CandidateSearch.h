@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/change/ChangeCandidate.h"
+#include "core/change/GenerationFailure.h"
 #include "core/change/MaterialIndex.h"
 #include "core/time/Framerate.h"
 
@@ -33,11 +34,11 @@ public:
 
     /// The candidates that survive for a valid new event, in the order of the old events. `lastDisplacement` is that of
     /// the previous placement, in seconds: among candidates of the same length, the one whose displacement is nearest
-    /// to it survives. Throws Result::OutOfRange when a candidate leaves the day, even if it wouldn't survive. Before
-    /// that, `onFailure` gets the index of its old event.
+    /// to it survives. When candidates leave the day, even ones that wouldn't survive, `onFailure` gets the index of one of
+    /// their old events. Either Result::OutOfRange is thrown then, or they are left out.
     std::vector<ChangeCandidate> survivingCandidates(const std::string& name, const EventBase& newEvent,
                                                      double lastDisplacement,
-                                                     const std::function<void(std::size_t)>& onFailure) const;
+                                                     const std::function<FailureAnswer(std::size_t)>& onFailure) const;
 
 private:
     Framerate m_framerate;

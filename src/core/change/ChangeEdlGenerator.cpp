@@ -25,11 +25,11 @@ class WorkingList {
 public:
     explicit WorkingList(const EventList& given) : m_given(given) { m_events.copyFrom(given); }
 
-    /// Before it throws, it gives `onFailure` the event that it fails on.
+    /// Gives `onFailure` each event that it fails on, and throws where that wants it.
     template <typename OnFailure>
     void expand(OnFailure onFailure)
     {
-        m_origins = expandTransitions(m_events, [&](std::size_t index) { onFailure(m_given.eventAt(index)); });
+        m_origins = expandTransitions(m_events, [&](std::size_t index) { return onFailure(m_given.eventAt(index)); });
     }
 
     const EventList& events() const { return m_events; }
@@ -70,7 +70,7 @@ ChangeEdlGenerator::ComparisonName ChangeEdlGenerator::comparisonName(const Even
 Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const EventList& newEvents,
                                           EventList& changeEvents) const
 {
-    return generate(oldEvents, newEvents, changeEvents, [](const GenerationFailure&) {});
+    return generate(oldEvents, newEvents, changeEvents, [](const GenerationFailure&) { return FailureAnswer::Stop; });
 }
 
 Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const EventList& newEvents,
@@ -80,8 +80,8 @@ Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const Even
     const Framerate framerate = Timecode::framerate();
     WorkingList oldWork(oldEvents);
     WorkingList newWork(newEvents);
-    oldWork.expand([&](const std::shared_ptr<EventBase>& oldEvent) { onFailure({oldEvent, nullptr}); });
-    newWork.expand([&](const std::shared_ptr<EventBase>& newEvent) { onFailure({nullptr, newEvent}); });
+    oldWork.expand([&](const std::shared_ptr<EventBase>& oldEvent) { return onFailure({oldEvent, nullptr}); });
+    newWork.expand([&](const std::shared_ptr<EventBase>& newEvent) { return onFailure({nullptr, newEvent}); });
 
     CandidateSearch search(framerate);
     for (std::size_t index = 0; index < oldWork.events().size(); ++index) {
@@ -101,7 +101,7 @@ Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const Even
         const auto [key, isVfx] = comparisonName(*newEvent);
         newEvent->setVfx(isVfx);
         const auto fail = [&](std::size_t oldIndex) {
-            onFailure({oldWork.originAt(oldIndex), newWork.originOf(newEvent)});
+            return onFailure({oldWork.originAt(oldIndex), newWork.originOf(newEvent)});
         };
         for (const ChangeCandidate& survivor : search.survivingCandidates(key, *newEvent, lastDisplacement, fail)) {
             survivor.changeEvent->setEventNumber(number++);

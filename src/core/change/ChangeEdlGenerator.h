@@ -39,7 +39,7 @@ public:
     /// Replaces the content of `changeEvents`; the inputs stay as they are. Returns Ok. Throws what the timecode
     /// arithmetic throws for a valid event, and Result::OutOfRange for a stretch that leaves the day.
     util::Result::Type generate(const EventList& oldEvents, const EventList& newEvents, EventList& changeEvents) const;
-    /// Likewise, and tells `onFailure` of the events before it throws on their account.
+    /// Likewise, but tells `onFailure` of the events before it throws on their account, and throws only where that wants it.
     util::Result::Type generate(const EventList& oldEvents, const EventList& newEvents, EventList& changeEvents,
                                 const GenerationFailureListener& onFailure) const;
 

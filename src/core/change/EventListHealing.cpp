@@ -88,25 +88,14 @@ std::shared_ptr<EventBase> neighbourOf(const EventList& events, const std::share
     return place == order.end() ? nullptr : place->event.lock();
 }
 
-/// Finishes also when the action throws.
-template <class Action, class Finish>
-void runAndFinish(Action action, Finish finish)
-{
-    try {
-        action();
-    } catch (...) {
-        finish();
-        throw;
-    }
-    finish();
-}
-
 } // namespace
 
 void EventList::heal(const EventList& selection, const EventList& referenceList, std::int32_t healMode)
 {
-    stopListening();
-    runAndFinish([&] { healSelection(selection, referenceList, healMode); }, [&] { listen(); });
+    {
+        const PausedListening paused(*this);
+        healSelection(selection, referenceList, healMode);
+    }
     notifyListeners();
 }
 
@@ -156,25 +145,29 @@ bool EventList::canHeal(const EventList& selection, const EventList& referenceLi
 
 void EventList::extendEvent(const std::shared_ptr<EventBase>& event, bool previous)
 {
-    const auto extend = [&] {
-        const std::shared_ptr<EventBase> neighbour = neighbourOf(*this, event, previous);
-        if (!neighbour)
-            return;
-        if (previous) {
-            const Timecode dstIn = neighbour->dstOut();
-            const Timecode srcIn = event->srcIn() - (event->dstIn() - dstIn);
-            event->setDstIn(dstIn);
-            event->setSrcIn(srcIn);
-        } else {
-            const Timecode dstOut = neighbour->dstIn();
-            const Timecode srcOut = event->srcOut() + (dstOut - event->dstOut());
-            event->setDstOut(dstOut);
-            event->setSrcOut(srcOut);
-        }
-    };
-    stopListening();
-    runAndFinish(extend, [&] { listen(); });
+    {
+        const PausedListening paused(*this);
+        extendInto(event, previous);
+    }
     notifyListeners();
+}
+
+void EventList::extendInto(const std::shared_ptr<EventBase>& event, bool previous) const
+{
+    const std::shared_ptr<EventBase> neighbour = neighbourOf(*this, event, previous);
+    if (!neighbour)
+        return;
+    if (previous) {
+        const Timecode dstIn = neighbour->dstOut();
+        const Timecode srcIn = event->srcIn() - (event->dstIn() - dstIn);
+        event->setDstIn(dstIn);
+        event->setSrcIn(srcIn);
+    } else {
+        const Timecode dstOut = neighbour->dstIn();
+        const Timecode srcOut = event->srcOut() + (dstOut - event->dstOut());
+        event->setDstOut(dstOut);
+        event->setSrcOut(srcOut);
+    }
 }
 
 bool EventList::canExtendEvent(const std::shared_ptr<EventBase>& event, bool previous) const

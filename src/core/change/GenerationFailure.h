@@ -16,7 +16,11 @@ struct GenerationFailure {
     std::shared_ptr<EventBase> newEvent; ///< null when the old event alone fails
 };
 
-/// Is told the events of a failure before the failure itself is thrown.
-using GenerationFailureListener = std::function<void(const GenerationFailure&)>;
+/// What is to become of a generation after a failure: it throws, or goes on without what failed.
+enum class FailureAnswer { Stop, PassOver };
+
+/// Is told the events of a failure, and says how to go on. An event that fails alone takes no part then. Of two that can't
+/// be brought together, each is still matched with other events.
+using GenerationFailureListener = std::function<FailureAnswer(const GenerationFailure&)>;
 
 } // namespace cadrel::core

@@ -18,7 +18,7 @@ namespace {
 auto twinKeyOf(const EventShape& shape)
 {
     return std::make_tuple(shape.srcIn, shape.srcOut, shape.dstOut - shape.dstIn, shape.transitionType,
-                           shape.transitionDuration, shape.motionSpeed);
+                           shape.transitionDuration, shape.motionSpeed, shape.isReversed);
 }
 
 } // namespace
@@ -27,14 +27,19 @@ EventShape::EventShape(const EventBase& event, const Framerate& framerate)
     : srcIn(event.srcIn().toFrameCount(framerate)), srcOut(event.srcOut().toFrameCount(framerate)),
       dstIn(event.dstIn().toFrameCount(framerate)), dstOut(event.dstOut().toFrameCount(framerate)),
       transitionType(event.transitionType()), transitionDuration(event.transitionDuration()),
-      motionSpeed(event.motionSpeed())
+      motionSpeed(event.motionSpeed()), isReversed(event.isReversed())
 {
+    if (!isReversed)
+        return;
+    const std::int32_t forwardIn = srcIn;
+    srcIn = framerate.lastFrame - srcOut;
+    srcOut = framerate.lastFrame - forwardIn;
 }
 
 bool EventShape::isPlayedLike(const EventShape& other) const
 {
     return EventBase::areSameSpeed(motionSpeed, other.motionSpeed) && transitionType == other.transitionType &&
-           transitionDuration == other.transitionDuration;
+           transitionDuration == other.transitionDuration && isReversed == other.isReversed;
 }
 
 void MaterialIndex::add(const std::string& name, const EventShape& shape, std::size_t index)

@@ -17,11 +17,18 @@ class EventBase;
 
 /// A valid event's timecodes as frame counts, and what else decides whether two events show the same material in the
 /// same way.
+///
+/// The source of a reversed shot is counted backwards from the end of the day, so that it rises with the programme as that
+/// of any other shot does:
+///
+///     source            |--- SRC IN ======== SRC OUT ---|      plays from SRC OUT to SRC IN
+///     counted           |--- srcIn ========= srcOut ----|
+///                     23:59:59:23                    00:00:00:00
 struct EventShape {
     /// Throws what Timecode::toFrameCount throws.
     EventShape(const EventBase& event, const Framerate& framerate);
 
-    /// Whether transition and motion speed (to 0.01) are the same.
+    /// Whether transition, motion speed (to 0.01) and direction are the same.
     bool isPlayedLike(const EventShape& other) const;
 
     std::int32_t srcIn;
@@ -31,6 +38,7 @@ struct EventShape {
     std::int32_t transitionType;
     std::int32_t transitionDuration;
     double motionSpeed;
+    bool isReversed;
 };
 
 /// Twins: the old events that use exactly the same stretch of source in the same way, at different places of the

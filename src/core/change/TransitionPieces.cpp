@@ -42,23 +42,30 @@ Timecode transitionSourceLength(const EventBase& event)
     return limited(length, event.srcIn(), event.srcOut());
 }
 
-/// Takes the transition off the front of an event and returns it as an event of its own.
+/// Takes the transition off the front of an event and returns it as an event of its own. A reversed shot begins at SRC OUT.
 std::shared_ptr<EventBase> cutOutTransition(EventBase& event, const EventBase* before)
 {
-    const Timecode srcSplit = event.srcIn() + transitionSourceLength(event);
+    const Timecode srcLength = transitionSourceLength(event);
+    const Timecode srcSplit = event.isReversed() ? event.srcOut() - srcLength : event.srcIn() + srcLength;
     const Timecode dstLength = limited(Timecode(event.transitionDuration()), event.dstIn(), event.dstOut());
     const Timecode dstSplit = event.dstIn() + dstLength;
 
     auto piece = std::make_shared<EventBase>();
     *piece = event;
-    piece->setTimecodes(event.srcIn(), srcSplit, event.dstIn(), dstSplit);
+    if (event.isReversed())
+        piece->setTimecodes(srcSplit, event.srcOut(), event.dstIn(), dstSplit);
+    else
+        piece->setTimecodes(event.srcIn(), srcSplit, event.dstIn(), dstSplit);
     if (before != nullptr && before->eventNumber() == event.eventNumber()) {
-        const std::string timecode = before->srcOut().toString();
+        const std::string timecode = before->lastSource().toString();
         piece->setRollName(pieceName(event.rollName(), before->rollName(), timecode));
         piece->setClipName(pieceName(event.clipName(), before->clipName(), timecode));
     }
 
-    event.setIn(srcSplit, dstSplit);
+    if (event.isReversed())
+        event.setTimecodes(event.srcIn(), srcSplit, dstSplit, event.dstOut());
+    else
+        event.setIn(srcSplit, dstSplit);
     event.setTransitionType(TransitionType::Cut);
     event.setTransitionDuration(0);
     return piece;
@@ -66,7 +73,8 @@ std::shared_ptr<EventBase> cutOutTransition(EventBase& event, const EventBase* b
 
 } // namespace
 
-std::vector<std::size_t> expandTransitions(EventList& events, const std::function<void(std::size_t)>& onFailure)
+std::vector<std::size_t> expandTransitions(EventList& events,
+                                           const std::function<FailureAnswer(std::size_t)>& onFailure)
 {
     EventList pieces;
     std::vector<std::size_t> origins;
@@ -78,10 +86,11 @@ std::vector<std::size_t> expandTransitions(EventList& events, const std::functio
             pieces.add(cutOutTransition(event, index > 0 ? &events.at(index - 1) : nullptr));
             origins.push_back(index);
         } catch (Result::Type) {
-            if (event.isValid()) {
-                onFailure(index);
+            if (!event.isValid())
+                continue;
+            if (onFailure(index) == FailureAnswer::Stop)
                 throw;
-            }
+            event.addFlaw(EventFlaw::TransitionDurationInvalid);
         }
     }
     events.append(pieces);

@@ -2,6 +2,8 @@
 
 #pragma once
 
+#include "core/change/GenerationFailure.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <functional>
@@ -19,11 +21,12 @@ class EventList;
 ///                                   |------ body ------|    cut
 ///
 /// A piece whose event shares its number with the event before it, as the two lines of a transition do, is named after
-/// both. An event that isn't valid and whose transition can't be cut out stays whole. Throws what the timecode
-/// arithmetic throws for a valid one, and before that gives its index to `onFailure`.
+/// both. An event that isn't valid and whose transition can't be cut out stays whole. For a valid one `onFailure` gets its
+/// index: either what the timecode arithmetic throws is thrown, or the event gets a flaw and stays whole.
 ///
 /// Returns the index of the event that each piece was cut from, in the order of the pieces.
-std::vector<std::size_t> expandTransitions(EventList& events, const std::function<void(std::size_t)>& onFailure);
+std::vector<std::size_t> expandTransitions(EventList& events,
+                                           const std::function<FailureAnswer(std::size_t)>& onFailure);
 
 /// Puts each transition piece and the body that follows it on both sides together again, and makes cuts of all events.
 /// Names are compared by clip name when `matchBy` is 1, otherwise by roll name.

@@ -16,6 +16,7 @@ struct CadrelRunState {
     Framerate framerate;
     const Settings* settings = nullptr;
     double previewOffset = 0.0; ///< seconds
+    double timeOrigin = 0.0;    ///< where the project's clock begins, in seconds
 };
 
 } // namespace cadrel::core

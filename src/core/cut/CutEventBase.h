@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/cut/CutEventSpans.h"
+#include "core/time/SecondsRange.h"
 
 #include <string>
 
@@ -18,6 +19,9 @@ public:
     virtual CutEventSpans update(double time) = 0;
     virtual std::wstring getTrackName() = 0;
     virtual bool isAudio() = 0;
+
+    /// What of the new programme is written: as much as there is material, at normal speed.
+    SecondsRange written() const { return {m_dstIn, m_dstIn + (m_srcOut - m_srcIn)}; }
 
     double& srcIn() { return m_srcIn; }
     double& srcOut() { return m_srcOut; }

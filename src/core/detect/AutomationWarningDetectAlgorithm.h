@@ -6,8 +6,8 @@
 
 namespace cadrel::core {
 
-/// Finds jumps of an automation curve from one range to the next: where the two meet and, unless the curve is led over
-/// gaps, at the end of a gap between them.
+/// Finds the jumps that a run has brought into the automation: those of the curves as they stand in the preview stretch,
+/// after all that is written there, which the old programme hasn't got at the place from which they were carried.
 class AutomationWarningDetectAlgorithm : public CadrelInformationAlgorithm {
 public:
     std::vector<MarkerEntry> detect(const CutList& cuts, const CadrelRunState& state,

@@ -75,6 +75,7 @@ EventBase& EventBase::operator=(const EventBase& other)
     m_comment = other.m_comment;
     m_vfx = other.m_vfx;
     m_sourceLine = other.m_sourceLine;
+    m_isReversed = other.m_isReversed;
     m_motionSpeed = other.m_motionSpeed;
     m_changeContext = other.m_changeContext;
     return *this;
@@ -343,6 +344,7 @@ void EventBase::readFields(ByteArchive& archive, std::uint32_t version)
         archive >> m_flawText;
     archive >> m_vfx;
     m_sourceLine = 0;
+    m_isReversed = false;
 }
 
 void EventBase::finishReading()

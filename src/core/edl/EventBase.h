@@ -57,7 +57,7 @@ struct TransitionType {
 /// The getters return references, which change with the event. Copy a value that you need after a setter.
 ///
 /// Every setter notifies with the event's own context after the change, except setEventNumber, setComment,
-/// setSourceLine, addFlaw and removeFlaw, which are called in bulk or before anyone listens.
+/// setSourceLine, setReversed, addFlaw and removeFlaw, which are called in bulk or before anyone listens.
 class EventBase : public serialize::Serializable, public ChangeContextNotificationBase {
 public:
     /// An event that has only flaw 0.
@@ -95,8 +95,16 @@ public:
     /// was read from no list. Copied like the other fields, not stored, and 0 after the event is read from an archive.
     std::uint32_t sourceLine() const { return m_sourceLine; }
     bool vfx() const { return m_vfx; }
+    /// Whether the shot plays from SRC OUT to SRC IN. Copied like the other fields, not stored, and false after the event
+    /// is read from an archive.
+    bool isReversed() const { return m_isReversed; }
+    /// Where in the source the shot begins and ends to play: SRC IN and SRC OUT, for a reversed shot the later one first.
+    const Timecode& firstSource() const { return beginsAtSrcOut() ? m_srcOut : m_srcIn; }
+    const Timecode& lastSource() const { return beginsAtSrcOut() ? m_srcIn : m_srcOut; }
     /// Source duration over destination duration; 0 for a freeze frame.
     double motionSpeed() const { return m_motionSpeed; }
+    /// The motion speed, below 0 for a reversed shot.
+    double signedSpeed() const { return m_isReversed ? -m_motionSpeed : m_motionSpeed; }
     const std::string& flawText() const { return m_flawText; }
 
     /// True without any flaw.
@@ -135,6 +143,7 @@ public:
     void setEventNumber(std::uint32_t number) { m_eventNumber = number; }
     void setComment(const std::string& text);
     void setSourceLine(std::uint32_t number) { m_sourceLine = number; }
+    void setReversed(bool flag) { m_isReversed = flag; }
     void addFlaw(std::int32_t flaw);
     void removeFlaw(std::int32_t flaw);
 
@@ -156,6 +165,7 @@ protected:
     void finishReading();
 
 private:
+    bool beginsAtSrcOut() const { return m_isReversed && m_srcIn < m_srcOut; }
     void updateFlawsAndSpeed();
     void updateFlaws(bool timecodesValid);
     void updateMotionSpeed(const Framerate& framerate);
@@ -179,6 +189,7 @@ private:
     std::string m_comment;
     bool m_vfx = false;
     std::uint32_t m_sourceLine = 0;
+    bool m_isReversed = false;
     double m_motionSpeed = 1.0;
     EventChangeContext m_changeContext;
     std::string m_flawText;

@@ -300,8 +300,13 @@ void EventList::notifyListeners()
 
 void EventList::readCurrent(ByteArchive& archive)
 {
-    const std::size_t count = archive.readCount();
-    stopListening();
+    readEvents(archive, archive.readCount());
+    notifyListeners();
+}
+
+void EventList::readEvents(ByteArchive& archive, std::size_t count)
+{
+    const PausedListening paused(*this);
     m_events.clear();
     // Each event takes at least its kind and its version number.
     m_events.reserve(std::min(count, archive.bytesLeft() / 8));
@@ -314,8 +319,6 @@ void EventList::readCurrent(ByteArchive& archive)
         archive >> *event;
         m_events.push_back(event);
     }
-    listen();
-    notifyListeners();
 }
 
 void EventList::write(ByteArchive& archive) const

@@ -139,16 +139,32 @@ public:
     /// Sends the list's own context when an event changes; ignores everything else.
     void onChange(const ChangeContext& context) override;
 
-    /// Throws Result::CorruptData for an unknown kind of event, and what the events throw.
+    /// Throws Result::CorruptData for an unknown kind of event, and what the events throw. The list holds the events
+    /// before it then, and goes on listening.
     void readCurrent(serialize::ByteArchive& archive) override;
     void write(serialize::ByteArchive& archive) const override;
 
 private:
+    /// While it lives, the list doesn't listen to its events. The list listens again also when the edit has failed.
+    class PausedListening {
+    public:
+        explicit PausedListening(EventList& list) : m_list(list) { m_list.stopListening(); }
+        PausedListening(const PausedListening&) = delete;
+        PausedListening& operator=(const PausedListening&) = delete;
+        ~PausedListening() { m_list.listen(); }
+
+    private:
+        EventList& m_list;
+    };
+
     void listen();
     void stopListening();
     void notifyListeners();
     TimecodeRange range(ListSide side) const;
     void shift(ListSide side, const Timecode& offset, bool forward);
+    void readEvents(serialize::ByteArchive& archive, std::size_t count);
+    /// Into the gap to the neighbour.
+    void extendInto(const std::shared_ptr<EventBase>& event, bool previous) const;
     void healSelection(const EventList& selection, const EventList& referenceList, std::int32_t healMode);
 
     std::vector<std::shared_ptr<EventBase>> m_events;

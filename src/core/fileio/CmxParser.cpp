@@ -6,10 +6,14 @@
 #include "core/edl/EventList.h"
 #include "core/fileio/EventLine.h"
 #include "core/fileio/LineReader.h"
+#include "core/fileio/MotionLine.h"
+#include "core/fileio/UnreadLines.h"
+#include "core/fileio/Utf16Lines.h"
 #include "util/FilePath.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
+#include <filesystem>
 #include <limits>
 #include <memory>
 #include <utility>
@@ -23,6 +27,8 @@ using util::StringUtil;
 namespace {
 
 constexpr std::string_view ClipNameKey = "NAME:";
+constexpr std::string_view ByteOrderMark = "\xEF\xBB\xBF";
+constexpr std::size_t DstIn = 2; ///< of the four timecodes of a line
 
 bool isDigit(char character)
 {
@@ -52,6 +58,13 @@ std::optional<Number> parseNumber(std::string_view text)
         value = std::min(value * 10 + static_cast<std::uint64_t>(character - '0'), Greatest);
     }
     return static_cast<Number>(value);
+}
+
+/// Why a line makes no event, as UnreadLine tells it.
+std::string problemOf(const EventLine& columns)
+{
+    const bool lacksDuration = columns.duration && !columns.duration->empty() && !parseNumber<int>(*columns.duration);
+    return lacksDuration ? "has a dissolve or wipe without a duration and isn't read" : "misses a field and isn't read";
 }
 
 /// An event that comment lines may still follow. Its comment is set when they all are there, so that it takes no more
@@ -110,6 +123,31 @@ public:
             m_current.applyComment(line);
     }
 
+    /// The shot that the line speaks of plays backwards: that of the event in hand, or in a transition that of the line with
+    /// the same roll. False when there is none.
+    bool reverse(const MotionLine& motion)
+    {
+        if (!m_isPending)
+            return false;
+        EventBase& current = *m_current.event;
+        EventBase& previous = *m_previous.event;
+        if (previous.eventNumber() != current.eventNumber()) {
+            current.setReversed(true);
+            return true;
+        }
+        const auto isMeant = [&](const EventBase& event) {
+            const bool tellsRoll = previous.rollName() != current.rollName();
+            return event.rollName() == motion.roll && (tellsRoll || motion.start == event.srcIn());
+        };
+        const bool isPreviousMeant = isMeant(previous);
+        const bool isCurrentMeant = isMeant(current) || (!isPreviousMeant && current.rollName() == motion.roll);
+        if (isPreviousMeant)
+            previous.setReversed(true);
+        if (isCurrentMeant)
+            current.setReversed(true);
+        return isPreviousMeant || isCurrentMeant;
+    }
+
     /// All events, once the file has ended.
     std::vector<std::shared_ptr<EventBase>> end()
     {
@@ -137,17 +175,37 @@ Result::Type CmxParser::parse(const std::wstring& path, EventList& events, Frame
 try {
     const std::string fileName = StringUtil::toUtf8(StringUtil::fileNameOf(path));
     EventCollector collector;
-    readLines(
-        path,
-        [&](std::string_view line, std::uint32_t lineNumber) {
+    UnreadLines unread;
+    m_remarks = {};
+    readLines(path, [&](LineKind kind, std::string_view line, std::uint32_t lineNumber) {
+        if (kind == LineKind::Event) {
+            const EventLine columns = columnsOf(line);
             EventBase& event = collector.begin();
             event.setEdlFileName(fileName);
             event.setSourceLine(lineNumber);
-            if (parseEventLine(line, acceptAudio, event))
+            if (readEvent(columns, acceptAudio, event)) {
                 collector.accept(line);
-        },
-        [&](std::string_view line) { collector.addComment(line); });
+                readDropFrameMark(columns, line, lineNumber);
+                unread.lookAfterEvent(line, lineNumber, columns.lengthIn(line));
+            } else {
+                unread.lookAtDropped(line, lineNumber, problemOf(columns));
+            }
+            return;
+        }
+        if (kind == LineKind::Comment)
+            collector.addComment(line);
+        if (m_isThorough && MotionLine::isOne(line)) {
+            const MotionLine motion(line);
+            if (!motion.isReadable)
+                unread.add(line, lineNumber, "is a motion line whose speed can't be read");
+            else if (motion.isBackwards && !collector.reverse(motion))
+                unread.add(line, lineNumber, "plays no event backwards, since none of its roll stands before it");
+        }
+        unread.lookAt(line, lineNumber,
+                      kind == LineKind::Comment ? UnreadLines::Kind::Comment : UnreadLines::Kind::Other);
+    });
     events.append(collector.end());
+    finishRemarks(path, unread.release());
     framerate = detectedFramerate();
     return Result::Ok;
 } catch (Result::Type failure) {
@@ -156,14 +214,13 @@ try {
 
 Result::Type CmxParser::detect(const std::wstring& path, Framerate& framerate)
 try {
-    readLines(
-        path,
-        [&](std::string_view line, std::uint32_t) {
-            const EventLine columns(line);
-            for (std::size_t index = 0; index < columns.timecodeCount; ++index)
-                parseTimecode(columns.timecodes[index]);
-        },
-        [](std::string_view) {});
+    readLines(path, [&](LineKind kind, std::string_view line, std::uint32_t) {
+        if (kind != LineKind::Event)
+            return;
+        const EventLine columns = columnsOf(line);
+        for (std::size_t index = 0; index < columns.timecodeCount; ++index)
+            parseTimecode(columns.timecodes[index]);
+    });
     framerate = detectedFramerate();
     return Result::Ok;
 } catch (Result::Type failure) {
@@ -198,42 +255,52 @@ Framerate CmxParser::detectedFramerate() const
     return {60, m_dropFrameState};
 }
 
-/// Calls one of the two for each event line and each comment line, and looks at the frame-count mode.
-template <class EventLineAction, class CommentAction>
-void CmxParser::readLines(const std::wstring& path, EventLineAction onEventLine, CommentAction onComment)
+/// Calls the action with each line, and looks at the frame-count mode.
+template <class Action>
+void CmxParser::readLines(const std::wstring& path, Action action)
 {
     LineReader reader(util::toFilePath(path));
     m_dropFrameState = -1;
-    while (const std::optional<std::string_view> line = reader.next()) {
-        if (line->empty())
+    while (const std::optional<std::string_view> read = reader.next()) {
+        std::string_view line = *read;
+        if (m_isThorough && line.starts_with(ByteOrderMark))
+            line = StringUtil::trimView(line.substr(ByteOrderMark.size()));
+        if (line.empty())
             continue;
-        if (line->starts_with("FCM"))
-            readFrameCountMode(reader, *line);
-        else if (isDigit(line->front()))
-            onEventLine(*line, reader.lineNumber());
-        else if (line->front() == '*')
-            onComment(*line);
+        LineKind kind = LineKind::Other;
+        if (line.starts_with("FCM")) {
+            kind = LineKind::FrameCountMode;
+            readFrameCountMode(line, reader.lineNumber());
+        } else if (isDigit(line.front())) {
+            kind = LineKind::Event;
+        } else if (line.front() == '*') {
+            kind = LineKind::Comment;
+        }
+        action(kind, line, reader.lineNumber());
     }
 }
 
-void CmxParser::readFrameCountMode(const LineReader& reader, std::string_view line)
+void CmxParser::readFrameCountMode(std::string_view line, std::uint32_t lineNumber)
 {
     if (!contains(line, "DROP FRAME"))
         return;
     const std::int32_t state = contains(line, "NON-DROP FRAME") ? 0 : 1;
     if (state != m_dropFrameState)
-        m_frameCountModeLine = {reader.lineNumber(), std::string(line)};
+        m_frameCountModeLine = {lineNumber, std::string(line)};
     m_dropFrameState = state;
 }
 
+EventLine CmxParser::columnsOf(std::string_view line) const
+{
+    return m_isThorough ? EventLine::withTabs(line) : EventLine(line);
+}
+
 /// False for a line that makes no event, because it has too few columns or the timecodes have no provider.
-bool CmxParser::parseEventLine(std::string_view line, bool acceptAudio, EventBase& event)
+bool CmxParser::readEvent(const EventLine& columns, bool acceptAudio, EventBase& event)
 try {
     using Setter = void (EventBase::*)(const Timecode&);
     static constexpr std::array<Setter, 4> Setters{&EventBase::setSrcIn, &EventBase::setSrcOut, &EventBase::setDstIn,
                                                    &EventBase::setDstOut};
-    const EventLine columns(line);
-
     if (const auto number = parseNumber<std::uint32_t>(columns.number))
         event.setEventNumber(*number);
     else
@@ -268,6 +335,32 @@ try {
     return columns.isComplete();
 } catch (Result::Type) {
     return false;
+}
+
+/// A ";" in a time of the programme says drop-frame, where no other line says more.
+void CmxParser::readDropFrameMark(const EventLine& columns, std::string_view line, std::uint32_t lineNumber)
+{
+    if (!m_remarks.dropFrameLine && contains(columns.timecodes[DstIn], ";"))
+        m_remarks.dropFrameLine = {lineNumber, std::string(line)};
+}
+
+void CmxParser::finishRemarks(const std::wstring& path, std::vector<UnreadLine> unreadLines)
+{
+    if (m_dropFrameState != -1)
+        m_remarks.dropFrameLine = m_frameCountModeLine;
+    m_remarks.dropFrame = m_remarks.dropFrameLine && m_dropFrameState == -1 ? 1 : m_dropFrameState;
+    for (std::size_t frames = 0; frames < m_frameHistogram.size(); ++frames) {
+        m_remarks.timecodeCount += static_cast<std::size_t>(m_frameHistogram[frames]);
+        if (m_frameHistogram[frames] > 0)
+            m_remarks.highestFrame = static_cast<std::int32_t>(frames);
+    }
+    m_remarks.unreadLines = std::move(unreadLines);
+    const std::filesystem::path file = util::toFilePath(path);
+    if (!isUtf16(file))
+        return;
+    m_remarks.unreadLines.clear();
+    for (SourceLine& line : numberedUtf16Lines(file))
+        m_remarks.unreadLines.push_back({std::move(line), "is UTF-16 text and isn't read"});
 }
 
 /// Also counts the timecode for the frame rate.

@@ -10,6 +10,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace cadrel::core {
 class EventBase;
@@ -17,11 +18,11 @@ class EventBase;
 
 namespace cadrel::core::fileio {
 
-class LineReader;
+struct EventLine;
 
 /// Reads CMX EDLs. It skips what it doesn't know, but checks each field: a line that is neither an event nor a comment
-/// is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. Only an event line
-/// with too few columns disappears.
+/// is skipped, and a field that can't be read adds a flaw to the event, which stays in the list. An event line with too
+/// few columns makes no event. The remarks tell of all lines that hold an event and made none.
 ///
 ///     FCM: NON-DROP FRAME
 ///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
@@ -32,6 +33,11 @@ class LineReader;
 ///     * TO CLIP NAME: SC14_TK1
 ///
 /// Lines end with CR if a CR comes before the first LF, otherwise with LF.
+///
+/// A thorough reading also takes lines whose columns are separated by tabs, a line after a byte order mark, and motion
+/// lines as far as they say that a shot is played backwards:
+///
+///     M2   A002C001       -24.0                11:00:03:00
 class CmxParser : public ParserInterface {
 public:
     using ParserInterface::parse;
@@ -46,20 +52,30 @@ public:
     /// The "FCM" line that says drop-frame, which stands for a rate of its own.
     std::optional<SourceLine> rateLine() const override;
 
+    void readThoroughly() override { m_isThorough = true; }
+    const FileRemarks& remarks() const override { return m_remarks; }
+
     /// The rate that the files show. It is drop-frame 30 if the last file says drop-frame. Otherwise it is the lowest
     /// nominal rate for the highest frames field below 60 that this parser has seen, with the drop-frame state of the
     /// last file's "FCM" lines. It is unknown when nothing shows it. Pulled-down rates are never detected.
     Framerate detectedFramerate() const;
 
 private:
-    template <class EventLineAction, class CommentAction>
-    void readLines(const std::wstring& path, EventLineAction onEventLine, CommentAction onComment);
-    void readFrameCountMode(const LineReader& reader, std::string_view line);
-    bool parseEventLine(std::string_view line, bool acceptAudio, EventBase& event);
+    enum class LineKind { FrameCountMode, Event, Comment, Other };
+
+    template <class Action>
+    void readLines(const std::wstring& path, Action action);
+    void readFrameCountMode(std::string_view line, std::uint32_t lineNumber);
+    EventLine columnsOf(std::string_view line) const;
+    bool readEvent(const EventLine& columns, bool acceptAudio, EventBase& event);
+    void readDropFrameMark(const EventLine& columns, std::string_view line, std::uint32_t lineNumber);
+    void finishRemarks(const std::wstring& path, std::vector<UnreadLine> unreadLines);
     std::optional<Timecode> parseTimecode(std::string_view column);
 
     std::int32_t m_dropFrameState = -1; ///< 0 non-drop, 1 drop-frame
     SourceLine m_frameCountModeLine;    ///< where `m_dropFrameState` was found
+    bool m_isThorough = false;
+    FileRemarks m_remarks;
     std::array<std::int32_t, 60> m_frameHistogram{};
 };
 

@@ -24,6 +24,7 @@ using util::StringUtil;
 namespace {
 
 using Events = std::span<const std::shared_ptr<EventBase>>;
+using Mode = CmxWriter::FrameCountMode;
 
 constexpr std::size_t LongestTitle = 70;
 constexpr std::size_t RollNameWidth = 8;
@@ -40,10 +41,12 @@ char transitionLetter(std::int32_t transitionType)
     }
 }
 
-std::string textOf(const std::wstring& title, Events events)
+std::string textOf(const std::wstring& title, Events events, Mode mode)
 {
     std::ostringstream text;
     text << "TITLE:   " << StringUtil::toPrintable(title).substr(0, LongestTitle) << '\n';
+    if (mode == Mode::DropFrame)
+        text << "FCM: DROP FRAME\n";
     for (std::size_t index = 0; index < events.size(); ++index) {
         const EventBase& event = *events[index];
         if (!event.isValid())
@@ -57,30 +60,30 @@ std::string textOf(const std::wstring& title, Events events)
     return std::move(text).str();
 }
 
-void writeFile(const std::wstring& path, Events events, FileReplacement& file)
+void writeFile(const std::wstring& path, Events events, Mode mode, FileReplacement& file)
 {
     const std::wstring title = StringUtil::fileNameOf(path);
     if (title.empty())
         throw Result::NotAvailable;
-    file.write(textOf(title, events));
+    file.write(textOf(title, events, mode));
     file.finish();
 }
 
-void writeOne(const std::wstring& path, Events events)
+void writeOne(const std::wstring& path, Events events, Mode mode)
 {
     FileReplacement file(util::toFilePath(path));
-    writeFile(path, events, file);
+    writeFile(path, events, mode, file);
     file.commit();
 }
 
 /// All files are written before the first one is put in place. If that fails for one of them, all are taken back.
-void writeSeveral(const std::wstring& path, Events events)
+void writeSeveral(const std::wstring& path, Events events, Mode mode)
 {
     std::deque<FileReplacement> files;
     while (!events.empty()) {
         const Events part = events.first(std::min(events.size(), CmxWriter::MostEventsInAFile));
         const std::wstring partPath = StringUtil::withIndex(path, static_cast<int>(files.size() + 1));
-        writeFile(partPath, part, files.emplace_back(util::toFilePath(partPath)));
+        writeFile(partPath, part, mode, files.emplace_back(util::toFilePath(partPath)));
         events = events.subspan(part.size());
     }
     for (FileReplacement& file : files)
@@ -135,9 +138,9 @@ try {
     if (events.isEmpty() || !events.hasReadableEvent())
         return Result::InvalidArgument;
     if (events.size() <= MostEventsInAFile)
-        writeOne(path, events.events());
+        writeOne(path, events.events(), m_mode);
     else
-        writeSeveral(path, events.events());
+        writeSeveral(path, events.events(), m_mode);
     return Result::Ok;
 } catch (Result::Type failure) {
     return failure;

@@ -10,7 +10,7 @@
 namespace cadrel::core::fileio {
 
 /// Writes CMX EDLs of cuts: a title line, then a line for each valid event, numbered by its position in the list. No
-/// comments, clip names, durations or frame-count mode are written.
+/// comments, clip names or durations are written, and the frame-count mode only where it is asked for.
 ///
 ///     TITLE:   reel3_change.edl
 ///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
@@ -23,6 +23,12 @@ public:
     /// The highest number for the three digits of the event number column.
     static constexpr std::size_t MostEventsInAFile = 999;
 
+    /// Whether a line after the title says that the timecodes are drop-frame. Without it the reader takes them for
+    /// non-drop, since all are written with ":".
+    enum class FrameCountMode { Unsaid, DropFrame };
+
+    explicit CmxWriter(FrameCountMode mode = FrameCountMode::Unsaid) : m_mode(mode) {}
+
     /// Returns InvalidArgument for an empty list and for one without a readable event, FileAccessFailed when the file
     /// can't be opened or written, NotAvailable when it could be but has an empty last component, or what is thrown
     /// while writing.
@@ -31,6 +37,9 @@ public:
     /// A roll name as the file's eight columns take it: capitals, digits and ".-_", and "SHOT_-12" for
     /// "SHOT_LONGNAME_12".
     static std::string normalizedRollName(const std::string& name);
+
+private:
+    FrameCountMode m_mode;
 };
 
 } // namespace cadrel::core::fileio

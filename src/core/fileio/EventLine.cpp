@@ -12,13 +12,15 @@ namespace {
 
 /// Takes the next column off the front of `rest`; nothing when there is none. A column that has only tabs counts as an
 /// empty column.
-std::optional<std::string_view> takeColumn(std::string_view& rest)
+template <class IsSeparator>
+std::optional<std::string_view> takeColumn(std::string_view& rest, IsSeparator isSeparator)
 {
-    rest.remove_prefix(std::min(rest.find_first_not_of(' '), rest.size()));
-    if (rest.empty())
+    const auto start = std::find_if_not(rest.begin(), rest.end(), isSeparator);
+    const auto end = std::find_if(start, rest.end(), isSeparator);
+    const std::string_view column(start, end);
+    rest = std::string_view(end, rest.end());
+    if (column.empty())
         return std::nullopt;
-    const std::string_view column = rest.substr(0, rest.find(' '));
-    rest.remove_prefix(column.size());
     return util::StringUtil::trimView(column);
 }
 
@@ -38,10 +40,12 @@ std::optional<TransitionType::Type> transitionTypeOf(std::string_view column)
 
 } // namespace
 
-EventLine::EventLine(std::string_view line)
+EventLine::EventLine(std::string_view line, Separators separators)
 {
-    const auto take = [&line](std::string_view& column) {
-        const std::optional<std::string_view> found = takeColumn(line);
+    const bool alsoTabs = separators == Separators::BlanksAndTabs;
+    const auto isSeparator = [alsoTabs](char character) { return character == ' ' || (alsoTabs && character == '\t'); };
+    const auto take = [&](std::string_view& column) {
+        const std::optional<std::string_view> found = takeColumn(line, isSeparator);
         column = found.value_or(std::string_view());
         return found.has_value();
     };
@@ -57,6 +61,21 @@ EventLine::EventLine(std::string_view line)
     }
     while (timecodeCount < timecodes.size() && take(timecodes[timecodeCount]))
         ++timecodeCount;
+}
+
+EventLine EventLine::withTabs(std::string_view line)
+{
+    const EventLine columns(line);
+    if (columns.isComplete())
+        return columns;
+    const EventLine tabbed(line, Separators::BlanksAndTabs);
+    return tabbed.isComplete() ? tabbed : columns;
+}
+
+std::size_t EventLine::lengthIn(std::string_view line) const
+{
+    const std::string_view last = timecodes.back();
+    return static_cast<std::size_t>(last.data() + last.size() - line.data());
 }
 
 } // namespace cadrel::core::fileio

@@ -17,11 +17,19 @@ namespace cadrel::core::fileio {
 ///     001  A001C003 V     C        10:00:00:00 10:00:04:00 01:00:00:00 01:00:04:00
 ///     002  A002C001 V     D    024 11:00:00:00 11:00:03:00 01:00:04:00 01:00:07:00
 struct EventLine {
+    enum class Separators { Blanks, BlanksAndTabs };
+
     /// Finds the columns of a trimmed line, of which the views are parts. Columns after the end of the line stay empty.
-    explicit EventLine(std::string_view line);
+    explicit EventLine(std::string_view line, Separators separators = Separators::Blanks);
+
+    /// The columns of a line whose columns may also be separated by tabs. They count as separators where a column would be
+    /// missing without them.
+    static EventLine withTabs(std::string_view line);
 
     /// Whether no column is missing.
     bool isComplete() const { return timecodeCount == timecodes.size(); }
+    /// Where the last column ends in `line`, from which a complete line was made.
+    std::size_t lengthIn(std::string_view line) const;
 
     std::string_view number;
     std::string_view rollName;

@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "core/fileio/FileRemarks.h"
 #include "core/fileio/SourceLine.h"
 #include "core/time/Framerate.h"
 #include "util/Result.h"
@@ -36,6 +37,13 @@ public:
 
     /// The line that says which rate the file has that was read last; nothing where its timecodes alone show it.
     virtual std::optional<SourceLine> rateLine() const = 0;
+
+    /// From now on, what the letter of the format passes over is read too where its meaning is plain, such as tabs between
+    /// columns, and the remarks are collected.
+    virtual void readThoroughly() = 0;
+
+    /// Of the last file that was parsed; empty before readThoroughly().
+    virtual const FileRemarks& remarks() const = 0;
 
     /// Without audio, and without returning the rate.
     util::Result::Type parse(const std::wstring& path, EventList& events)

@@ -85,9 +85,9 @@ std::vector<PictureLine::Edge> PictureLine::edgesOf(const EventList& events, Pic
         PictureLayer layer;
         layer.event = static_cast<std::uint32_t>(index);
         if (PictureNames::hasReadableSource(event, framerate)) {
-            const std::int32_t srcIn = event.srcIn().toFrameCount(framerate);
-            layer.speed = static_cast<double>(event.srcOut().toFrameCount(framerate) - srcIn) / frames.length();
-            layer.origin = srcIn - frames.start * layer.speed;
+            const std::int32_t first = event.firstSource().toFrameCount(framerate);
+            layer.speed = static_cast<double>(event.lastSource().toFrameCount(framerate) - first) / frames.length();
+            layer.origin = first - frames.start * layer.speed;
         }
         std::int32_t bodyStart = frames.start;
         if (event.isTransition() && event.transitionDuration() > 0) {

@@ -19,7 +19,7 @@ constexpr char Separator = '\n';
 fileio::EventLine columnsOf(const EventBase& event)
 {
     const std::string_view comment = event.comment();
-    return fileio::EventLine(comment.substr(0, comment.find('\n')));
+    return fileio::EventLine::withTabs(comment.substr(0, comment.find('\n')));
 }
 
 std::string sourceTextOf(const EventBase& event)
@@ -54,7 +54,7 @@ std::uint32_t PictureNames::numberOfTransition(const EventBase& event, const Eve
     std::string text = textOf(event, framerate);
     text += Separator + std::to_string(event.transitionType()) + ' ' + std::to_string(event.transitionDuration());
     if (outgoing != nullptr)
-        text += Separator + textOf(*outgoing, framerate) + Separator + outgoing->srcOut().toString();
+        text += Separator + textOf(*outgoing, framerate) + Separator + outgoing->lastSource().toString();
     return numberOf(text);
 }
 

@@ -130,7 +130,7 @@ void DataModel::notifyPreviewState()
 
 Result::Type DataModel::generateChangeEdl()
 {
-    return generateChangeEdl([](const GenerationFailure&) {});
+    return generateChangeEdl([](const GenerationFailure&) { return FailureAnswer::Stop; });
 }
 
 Result::Type DataModel::generateChangeEdl(const GenerationFailureListener& onFailure)

@@ -41,6 +41,7 @@ struct PropertyKey {
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
         ProjectEnd = 10021,             ///< double, from the time origin, as it stood when the preview went on
+        PreviewOrigin = 10022,          ///< double, the time origin when the preview stretch was written
     };
 };
 
@@ -85,8 +86,8 @@ public:
     /// thrown, and leaves the change EDL empty. Sends one list change in any case. Only an exception of a listener that
     /// isn't a Result passes through, and sends nothing; the model goes on listening.
     util::Result::Type generateChangeEdl();
-    /// Likewise, and tells `onFailure` first which events of the old and the new EDL the failure is due to. It isn't
-    /// told of a failure that is due to none, such as a VFX row that doesn't compile.
+    /// Likewise, but tells `onFailure` first which events of the old and the new EDL a failure is due to, and goes on
+    /// without them if it wants that. It isn't told of a failure that is due to none, such as a VFX row that doesn't compile.
     util::Result::Type generateChangeEdl(const GenerationFailureListener& onFailure);
     /// Marks the VFX shots of the old and the new EDL by the settings. Throws Result::InvalidArgument for an enabled
     /// row that doesn't compile, with no event touched.

@@ -39,6 +39,20 @@ const EventBase* outgoingOf(const EventList& events, std::size_t index)
     return &events.at(index - 1);
 }
 
+/// The material's name without its version. A reversed shot is another material than one that plays forwards.
+std::string keyOf(const EventBase& event, const PictureRules& rules)
+{
+    return rules.versions.stripVersion(nameBy(rules.matchBy, event)) +
+           (event.isReversed() ? Separator + std::string("reversed") : std::string());
+}
+
+/// The first source frame, in a count that rises with the programme.
+std::int32_t firstSourceFrame(const EventBase& event, const Framerate& framerate)
+{
+    const std::int32_t frame = event.firstSource().toFrameCount(framerate);
+    return event.isReversed() ? framerate.lastFrame - frame : frame;
+}
+
 } // namespace
 
 EventPicture::EventPicture(const EventList& events, std::size_t index, const PictureRules& rules, TextNumbers& numbers)
@@ -46,7 +60,7 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Pic
 {
     const EventBase& event = events.at(index);
     const std::string& name = nameBy(rules.matchBy, event);
-    const std::string key = rules.versions.stripVersion(name);
+    const std::string key = keyOf(event, rules);
     const std::int32_t version = numbers.numberOf(materialText("version", {name}));
 
     if (!event.isValid()) {
@@ -56,12 +70,12 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Pic
         m_body = {numbers.numberOf(text), version, 0.0, 1.0};
         return;
     }
-    const double srcIn = event.srcIn().toFrameCount(rules.framerate);
+    const double source = firstSourceFrame(event, rules.framerate);
     const double speed = event.motionSpeed();
     if (EventBase::areSameSpeed(speed, FreezeSpeed))
         m_body = {numbers.numberOf(materialText("freeze", {key, event.srcIn().toString()})), version, 0.0, 1.0};
     else
-        m_body = {numbers.numberOf(materialText("clip", {key})), version, srcIn, event.isNormalSpeed() ? 1.0 : speed};
+        m_body = {numbers.numberOf(materialText("clip", {key})), version, source, event.isNormalSpeed() ? 1.0 : speed};
     if (!event.isTransition() || event.transitionDuration() <= 0)
         return;
 
@@ -69,9 +83,9 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Pic
     const std::string outgoingName = outgoing == nullptr ? std::string() : nameBy(rules.matchBy, *outgoing);
     const std::string text =
         materialText("transition", {std::to_string(event.transitionType()), std::to_string(event.transitionDuration()),
-                                    key, event.srcIn().toString(), std::to_string(std::lround(speed * 100)),
-                                    rules.versions.stripVersion(outgoingName),
-                                    outgoing == nullptr ? std::string() : outgoing->srcOut().toString()});
+                                    key, event.firstSource().toString(), std::to_string(std::lround(speed * 100)),
+                                    outgoing == nullptr ? std::string() : keyOf(*outgoing, rules),
+                                    outgoing == nullptr ? std::string() : outgoing->lastSource().toString()});
     m_transition = {numbers.numberOf(text), numbers.numberOf(materialText("version", {name, outgoingName})), 0.0, 1.0};
     m_transitionLength = std::min(event.transitionDuration(), event.dstOut().toFrameCount(rules.framerate) -
                                                                   event.dstIn().toFrameCount(rules.framerate));

@@ -265,7 +265,8 @@ private:
         const EventBase* const oldShot = shotOf(m_oldCut, oldPiece.event);
         const EventBase* const newShot = shotOf(m_newCut, newPiece.event);
         return oldShot != nullptr && newShot != nullptr && oldShot->isValid() && newShot->isValid() &&
-               oldShot->rollName() == newShot->rollName() && !oldShot->hasSpeed(newShot->motionSpeed()) &&
+               oldShot->rollName() == newShot->rollName() &&
+               !EventBase::areSameSpeed(oldShot->signedSpeed(), newShot->signedSpeed()) &&
                (oldShot->srcIn() < newShot->srcOut() || oldShot->srcIn() == newShot->srcIn()) &&
                (newShot->srcIn() < oldShot->srcOut() || oldShot->srcIn() == newShot->srcIn());
     }

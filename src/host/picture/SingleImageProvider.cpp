@@ -3,6 +3,7 @@
 #include "host/picture/SingleImageProvider.h"
 
 #include "gui/picture/VideoProviderBase.h"
+#include "util/ModulePin.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
@@ -20,9 +21,11 @@ SingleImageProvider::SingleImageProvider(gui::VideoProviderBase& provider, Velma
 SingleImageProvider::~SingleImageProvider()
 {
     m_source.removeListener(this);
-    // A thread that the host doesn't give back can't be ended, nor can it do without what it uses.
-    if (!m_thread->stop())
+    // A thread that the host doesn't give back can't be ended, nor can it do without what it uses and the code that it runs.
+    if (!m_thread->stop()) {
+        util::pinModule();
         static_cast<void>(m_thread.release());
+    }
 }
 
 void SingleImageProvider::requestImage(int width, int height, bool lastFrame, double time)

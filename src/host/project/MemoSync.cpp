@@ -79,7 +79,8 @@ std::vector<MemoSync::Stretch> MemoSync::stretchesOf(const Previewed& previewed,
 {
     const Events& events = previewed.events;
     const core::Framerate framerate = previewed.framerate;
-    const double offset = previewed.offset;
+    const double moved = previewed.moved;
+    const double offset = previewed.offset + moved;
     const auto isWritten = [](const core::EventBase& event) {
         return !event.hasFlaw(core::EventFlaw::TimecodeInvalid) && event.srcIn() < event.srcOut() &&
                event.dstIn() < event.dstOut();
@@ -98,8 +99,8 @@ std::vector<MemoSync::Stretch> MemoSync::stretchesOf(const Previewed& previewed,
             pieces = without(pieces, previewOf(*events[later]));
     }
 
-    const double srcIn = event.srcIn().toSeconds(framerate);
-    const double srcOut = event.srcOut().toSeconds(framerate);
+    const double srcIn = event.srcIn().toSeconds(framerate) + moved;
+    const double srcOut = event.srcOut().toSeconds(framerate) + moved;
     std::vector<Stretch> stretches;
     for (const SecondsRange& piece : pieces) {
         const SecondsRange source{srcIn + (piece.start - whole.start),
@@ -139,8 +140,9 @@ MemoSync::Preview MemoSync::previewOf(const Track& memos, const Previewed& previ
     }
 
     preview.adrift = memos.clipEvents();
-    std::erase_if(preview.adrift,
-                  [offset = previewed.offset](const HostEvent& memo) { return isBefore(memo.getEnd(), offset); });
+    std::erase_if(preview.adrift, [offset = previewed.offset + previewed.moved](const HostEvent& memo) {
+        return isBefore(memo.getEnd(), offset);
+    });
     const auto give = [&preview](Shown& shown, const auto& belongs) {
         std::erase_if(preview.adrift, [&](const HostEvent& memo) {
             if (!belongs(memo))
@@ -160,9 +162,12 @@ MemoSync::Preview MemoSync::previewOf(const Track& memos, const Previewed& previ
 
 void MemoSync::remember(const Track& memos, const Previewed& previewed)
 {
+    // After a failure nothing is known. What is known in part would look as if the user had written the rest.
     m_remembered.clear();
+    std::map<std::shared_ptr<core::EventBase>, Memos> found;
     for (const Shown& shown : previewOf(memos, previewed).shown)
-        std::ranges::transform(shown.copies, std::back_inserter(m_remembered[shown.event]), memoOf);
+        std::ranges::transform(shown.copies, std::back_inserter(found[shown.event]), memoOf);
+    m_remembered = std::move(found);
 }
 
 void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTransaction& transaction)

@@ -37,6 +37,7 @@ public:
         const Events& events;
         core::Framerate framerate; ///< of their timecodes
         double offset;             ///< how much later than its destination each one stands, in seconds
+        double moved = 0.0;        ///< how far the time origin has moved since they were written, in seconds
     };
 
     /// The context outlives this object.

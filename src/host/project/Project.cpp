@@ -112,8 +112,11 @@ std::vector<Track> Project::cadrelTracks()
 
 std::vector<Track> Project::availableTracks()
 {
+    findMarkerTracks();
     std::vector<Track> tracks = cadrelTracks();
-    std::erase_if(tracks, [](const Track& track) { return track.hostLocked() && !track.hasLockState(); });
+    std::erase_if(tracks, [this](const Track& track) {
+        return isMarkerTrackOfRuns(track) || (track.hostLocked() && !track.hasLockState());
+    });
     return tracks;
 }
 
@@ -231,7 +234,7 @@ void Project::setLocators(bool adjust, double left, double right)
 
 core::CadrelRunState Project::runState()
 {
-    return {&m_model.oldEdl(), &m_model.newEdl(), getFramerate(), &m_model.settings(), previewOffset()};
+    return {&m_model.oldEdl(), &m_model.newEdl(), getFramerate(), &m_model.settings(), previewOffset(), timeOrigin()};
 }
 
 core::CadrelPreviewState Project::previewState()
@@ -263,17 +266,20 @@ void Project::onProjectEdited(IEditTransaction& transaction)
 
 MemoSync::Previewed Project::previewed() const
 {
-    return {m_previewEvents->events(), getFramerate(), requiredOffset()};
+    Variant origin(timeOrigin());
+    m_model.getProperty(PropertyKey::PreviewOrigin, origin);
+    return {m_previewEvents->events(), getFramerate(), requiredOffset(), timeOrigin() - origin.toDouble()};
 }
 
 void Project::syncMemos(IEditTransaction& transaction)
 {
     Track& memos = markerTrack(TrackRole::Memos);
-    findTrack(memos, TypeWord::Marker, TrackRole::Memos);
+    findMarkerTracks();
     if (!memos.hasChanged())
         return;
-    memos.assignIds(0.0, requiredOffset() - timeOrigin());
-    m_memoSync.follow(memos, previewed(), transaction);
+    const MemoSync::Previewed shown = previewed();
+    memos.assignIds(0.0, shown.offset + shown.moved - timeOrigin());
+    m_memoSync.follow(memos, shown, transaction);
 }
 
 void Project::rememberMemos()

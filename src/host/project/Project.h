@@ -84,7 +84,8 @@ public:
     /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
     /// model is empty then.
     void load();
-    /// Replaces what is stored. A failure leaves nothing stored.
+    /// Replaces what is stored. After a failure, what was stored before is there, but when it is the previewed events alone
+    /// that can't be stored, the rest is.
     void save();
 
     /// The host's rate, as it was when it told of changes last. Throws Result::NotSupported for a rate that isn't one.
@@ -98,7 +99,8 @@ public:
     std::vector<Track> tracksOfType(const char* word);
     /// All but folders and rulers: those that a run may change.
     std::vector<Track> cadrelTracks();
-    /// Those of them that the user hasn't locked: what the system itself holds locked, a run frees.
+    /// Those of them that a run could carry over: none that the user has locked, though a run frees what the system itself
+    /// holds locked, and none on which runs alone write.
     std::vector<Track> availableTracks();
     /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
     /// alone, in which nobody else edits.
@@ -150,14 +152,16 @@ public:
     void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
     /// The tracks are those whose material a run carries over, and the memos'.
     std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
-    /// Brings the preview stretch back over the real programme, from which the markers of an earlier run go. A restricted run clears the preview too, also where its
-    /// range is empty and nothing is brought back.
+    /// Brings the preview stretch back over the real programme, from which the markers of an earlier run go. Those that
+    /// reach out of a restricted range are cut at its edge: outside of it the programme is still the one that they describe.
+    /// A restricted run clears the preview too, also where its range is empty and nothing is brought back.
     void completeApply(Velmark::IEditTransaction& transaction);
     /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws Result::InvalidArgument for an entry
     /// whose kind is none of MarkerKind; earlier ones stay written.
     void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
-    /// Lets each curve keep the value that it has come to where the cuts leave a gap, and have its first one before the first
-    /// cut. With `isWholeProgramme` it keeps the last one after the last cut too, to the end of what the run replaces. The
+    /// Lets each curve keep the value that it has come to where the cuts leave a gap and after the last cut, to the end of
+    /// what the run replaces, and have its first one before the first cut. With `isWholeProgramme` it keeps the last one for
+    /// good, and otherwise nothing that clearPreview doesn't take away is left. The
     /// cuts are those that makeCut made, and their order doesn't matter.
     void holdAutomation(Velmark::IEditTransaction& transaction, const core::CutList& cuts, bool isWholeProgramme);
     /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what
@@ -225,6 +229,9 @@ private:
     Track newVideoTrack();
     /// Whether markers can be written there. On a track that the user has locked they would stay in the preview stretch.
     static bool takesMarkers(const Track& track) { return track.isAlive() && !track.hostLocked(); }
+    /// Finds the marker tracks that are there by their stored roles, whatever kinds of markers are switched on: the first of
+    /// each role.
+    void findMarkerTracks();
     /// Puts a track of that role into the slot unless the one there is alive. False when there is none.
     bool findTrack(Track& slot, const char* word, std::int32_t role);
     void findOrCreateTrack(Velmark::IEditTransaction& transaction, Track& slot, const char* word, std::int32_t role);

@@ -50,6 +50,9 @@ bool precedes(const SecondsRange& a, const SecondsRange& b)
 /// Cuts that are no further apart than this touch, in seconds.
 constexpr double ShortestGap = 0.01;
 
+/// A preview leaves nothing in the last seconds of what is cleared when it ends. A point at the very end would stay.
+constexpr double ClearedMargin = 1.0;
+
 bool isLongEnough(const SecondsRange& gap)
 {
     return isBefore(ShortestGap, gap.end - gap.start);
@@ -116,8 +119,9 @@ GapTracks gapTracksOf(const std::vector<Track>& tracks, const core::CutList& cut
     for (std::size_t i = 0; i < cuts.size(); ++i) {
         for (const auto& cutEvent : cuts.cutAt(i)->cutEvents()) {
             const auto ofTrack = found.find(hostEvent(cutEvent).track().node());
-            if (ofTrack != found.end() && isBefore(cutEvent->dstIn(), cutEvent->dstOut()))
-                cover(ofTrack->second.done, {cutEvent->dstIn(), cutEvent->dstOut()});
+            const SecondsRange written = cutEvent->written();
+            if (ofTrack != found.end() && isBefore(written.start, written.end))
+                cover(ofTrack->second.done, written);
         }
     }
     return found;
@@ -162,6 +166,7 @@ std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBas
     const double dstIn = changeEvent->dstIn().toSeconds(framerate);
     const double dstOut = changeEvent->dstOut().toSeconds(framerate);
 
+    findMarkerTracks();
     core::Cut::CutEvents cutEvents;
     for (const Track& track : cadrelTracks()) {
         // The markers of an earlier run aren't carried over: this run writes them anew. completeApply empties the memos'
@@ -183,6 +188,8 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
 {
     const double offset = requiredOffset();
     const core::EventBase& event = *cut.event();
+    if (m_model.isPreviewActive())
+        m_model.setProperty(core::PropertyKey::PreviewOrigin, core::Variant(timeOrigin()));
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
     for (const SourceGroup& group : groupsOf(cut)) {
@@ -239,12 +246,13 @@ void Project::holdAutomation(IEditTransaction& transaction, const core::CutList&
                                 written.front().start + offset);
             for (std::size_t i = 1; i < written.size(); ++i)
                 curve.hold(m_hostContext, transaction, written[i - 1].end + offset, written[i].start + offset);
+            const double last = written.back().end + offset;
             if (!isWholeProgramme)
-                continue;
-            if (m_model.settings().restrictRange())
-                curve.hold(m_hostContext, transaction, written.back().end + offset, end + offset);
+                curve.hold(m_hostContext, transaction, last, std::min(end, offset - ClearedMargin) + offset);
+            else if (m_model.settings().restrictRange())
+                curve.hold(m_hostContext, transaction, last, end + offset);
             else
-                curve.holdLast(m_hostContext, transaction, written.back().end + offset, end + offset);
+                curve.holdLast(m_hostContext, transaction, last, end + offset);
         }
     }
 }
@@ -285,6 +293,7 @@ void Project::markVirginTerritories(IEditTransaction& transaction, const core::C
 
 void Project::completeApply(IEditTransaction& transaction)
 {
+    findMarkerTracks();
     std::vector<Track> tracks = cadrelTracks();
     std::erase_if(tracks, [this](const Track& track) {
         return track.hostLocked() || !(isWanted(track) || isMarkerTrack(track));
@@ -305,10 +314,7 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
     const double offset = requiredOffset();
     m_indexes.clear();
     for (Track& track : tracks) {
-        if (isMarkerTrackOfRuns(track))
-            track.removeStartingIn(transaction, start, end);
-        else
-            track.removeRange(transaction, start, end);
+        track.removeRange(transaction, start, end);
         tick(1);
     }
     // What is before the stretch belongs to the real programme, and an edge there would leave automation points in it.
@@ -323,6 +329,7 @@ void Project::clearPreview(IEditTransaction& transaction)
 {
     const double offset = requiredOffset();
     setTracksLocked(false);
+    m_model.removeProperty(core::PropertyKey::PreviewOrigin);
     // Automation may reach further than the events, which alone make the end of the project.
     deleteRange(transaction, offset, offset + std::max(offset, projectEnd()));
 }

@@ -12,6 +12,7 @@
 
 #include <cstdint>
 #include <limits>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -66,6 +67,45 @@ std::uint32_t readChecksum(IProjectNode& project)
     return static_cast<std::uint32_t>(checksum.asInteger());
 }
 
+/// The two attributes, which belong together.
+struct Stored {
+    FVariant list;
+    FVariant checksum;
+};
+
+/// Nothing where one of them isn't there or can't be one that was stored.
+std::optional<Stored> storedIn(IProjectNode& project)
+{
+    Stored stored;
+    if (project.hasAttribute(AttributeKey::Storage) != ResultOk ||
+        project.hasAttribute(AttributeKey::StorageChecksum) != ResultOk ||
+        project.getAttribute(AttributeKey::Storage, stored.list) != ResultOk ||
+        project.getAttribute(AttributeKey::StorageChecksum, stored.checksum) != ResultOk || !stored.list.isObject() ||
+        !stored.checksum.isInteger())
+        return std::nullopt;
+    return stored;
+}
+
+bool isKept(IProjectNode& project, const Stored& stored)
+{
+    return project.setAttribute(AttributeKey::Storage, stored.list, true) == ResultOk &&
+           project.setAttribute(AttributeKey::StorageChecksum, stored.checksum, true) == ResultOk;
+}
+
+/// Throws Result::HostCallFailed when the host doesn't keep both.
+void replaceStored(IProjectNode& project, const Stored& stored)
+{
+    const std::optional<Stored> before = storedIn(project);
+    if (isKept(project, stored))
+        return;
+    // A list with the checksum of another would count as damaged.
+    if (!before || !isKept(project, *before)) {
+        project.removeAttribute(AttributeKey::Storage);
+        project.removeAttribute(AttributeKey::StorageChecksum);
+    }
+    throw Result::HostCallFailed;
+}
+
 } // namespace
 
 void Project::load()
@@ -104,8 +144,15 @@ void Project::readModel()
     // The timecodes in the block are those of this project.
     const FramerateScope ownRate(*this);
     block >> m_model;
-    if (isPreviewing() && resultOf([&] { readPreviewEvents(*list); }) != Result::Ok)
+    if (!isPreviewing())
+        return;
+    if (resultOf([&] { readPreviewEvents(*list); }) != Result::Ok)
         m_previewEvents->clear();
+    // Where nothing is known of the copies, they are compared with their memos.
+    resultOf([this] {
+        findMarkerTracks();
+        rememberMemos();
+    });
 }
 
 void Project::readPreviewEvents(IAttributeData& list)
@@ -119,8 +166,6 @@ void Project::readPreviewEvents(IAttributeData& list)
     if (events.crc32() != checksum)
         throw Result::ChecksumMismatch;
     events >> *m_previewEvents;
-    findTrack(markerTrack(TrackRole::Memos), TypeWord::Marker, TrackRole::Memos);
-    rememberMemos();
 }
 
 void Project::writePreviewEvents(IAttributeData& list) const
@@ -137,20 +182,14 @@ void Project::writePreviewEvents(IAttributeData& list) const
 void Project::save()
 {
     const auto project = root();
-    project->removeAttribute(AttributeKey::Storage);
-    project->removeAttribute(AttributeKey::StorageChecksum);
-
     ByteArchive block;
     block << m_model;
     const auto list = required(create<IAttributeData>(m_hostContext));
     writeBlock(*list, AttributeKey::StorageData, block);
-    writePreviewEvents(*list);
-    requireOk(project->setAttribute(AttributeKey::Storage, FVariant::object(list.get()), true));
-    const int32 result = project->setAttribute(AttributeKey::StorageChecksum, FVariant::integer(block.crc32()), true);
-    // A block without a checksum would count as damaged.
-    if (result != ResultOk)
-        project->removeAttribute(AttributeKey::Storage);
-    requireOk(result);
+    FirstFailure failure;
+    failure.ofStep([&] { writePreviewEvents(*list); });
+    failure.ofStep([&] { replaceStored(*project, {FVariant::object(list.get()), FVariant::integer(block.crc32())}); });
+    failure.raise();
 }
 
 } // namespace cadrel::host

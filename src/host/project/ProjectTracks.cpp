@@ -22,6 +22,7 @@ constexpr std::int32_t RoleBits = 0xff;
 void Project::createMarkerTracks(IEditTransaction& transaction)
 {
     findOrCreateTrack(transaction, m_folderTrack, TypeWord::Folder, TrackRole::Markers);
+    findMarkerTracks();
     for (const core::MarkerTrack& track : core::MarkerTracks) {
         if (track.isOn(m_model.settings()))
             findOrCreateMarkerTrack(transaction, track.role);
@@ -48,14 +49,10 @@ void Project::setTracksLocked(bool lock)
     FirstFailure failure;
     for (Track& track : m_lockedTracks)
         failure.ofStep([&] { setLock(track); });
-    for (std::int32_t role = TrackRole::Destination; role <= TrackRole::LastMarker; ++role) {
-        failure.ofStep([&] {
-            findTrack(markerTrack(role), TypeWord::Marker, role);
-            // The user goes on to write memos in a preview.
-            if (role != TrackRole::Memos)
-                setLock(markerTrack(role));
-        });
-    }
+    failure.ofStep([this] { findMarkerTracks(); });
+    // The user goes on to write memos in a preview.
+    for (std::int32_t role = TrackRole::Destination; role < TrackRole::Memos; ++role)
+        failure.ofStep([&] { setLock(markerTrack(role)); });
     failure.ofStep([&] {
         Track video = newVideoTrack();
         setLock(video);
@@ -66,8 +63,7 @@ void Project::setTracksLocked(bool lock)
 void Project::collectLockTracks()
 {
     m_lockedTracks.clear();
-    for (std::int32_t role = TrackRole::Destination; role <= TrackRole::LastMarker; ++role)
-        findTrack(markerTrack(role), TypeWord::Marker, role);
+    findMarkerTracks();
     const Track video = newVideoTrack();
     for (const Track& track : cadrelTracks()) {
         const bool isOwn = isMarkerTrack(track) || track == video;
@@ -99,6 +95,17 @@ Track Project::newVideoTrack()
     Track video;
     findTrack(video, TypeWord::Video, TrackRole::NewVideo);
     return video;
+}
+
+void Project::findMarkerTracks()
+{
+    if (std::ranges::all_of(m_markerTracks, &Track::isAlive))
+        return;
+    for (const Track& candidate : tracksOfType(TypeWord::Marker)) {
+        const std::int32_t role = candidate.role() & RoleBits;
+        if (role >= TrackRole::Destination && role <= TrackRole::LastMarker && !markerTrack(role).isAlive())
+            markerTrack(role) = candidate;
+    }
 }
 
 bool Project::findTrack(Track& slot, const char* word, std::int32_t role)

@@ -203,6 +203,13 @@ void Track::setRole(std::int32_t role)
     requireOk(node->setAttribute(roleKey(), FVariant::integer(role), true));
 }
 
+void Track::removeRole()
+{
+    const auto node = requiredNode();
+    if (node->hasAttribute(roleKey()) == ResultOk)
+        requireOk(node->removeAttribute(roleKey()));
+}
+
 bool Track::hasRole(std::int32_t role, std::int32_t mask) const
 {
     if (!isAlive())
@@ -330,17 +337,17 @@ void Track::removeEvent(IEditTransaction& transaction, HostEvent& event)
 
 void Track::removeRange(IEditTransaction& transaction, double start, double end)
 {
-    std::vector<Counted<IProjectNode>> children = childrenStartingIn(start, end);
+    const auto node = requiredNode();
+    if (start > end)
+        throw Result::InvalidArgument;
+    const double from = start - timeOrigin();
     const double to = end - timeOrigin();
-    std::erase_if(children, [to, times = container()](const Counted<IProjectNode>& child) {
-        return isBefore(to, orderedSpanOf(*child, times.get()).end);
+    std::vector<Counted<IProjectNode>> children = childrenOf(*node);
+    std::erase_if(children, [from, to, times = container()](const Counted<IProjectNode>& child) {
+        const core::SecondsRange span = orderedSpanOf(*child, times.get());
+        return isBefore(span.start, from) || !isBefore(span.start, to) || isBefore(to, span.end);
     });
     removeChildren(transaction, children);
-}
-
-void Track::removeStartingIn(IEditTransaction& transaction, double start, double end)
-{
-    removeChildren(transaction, childrenStartingIn(start, end));
 }
 
 TrackIndex Track::readIndex() const
@@ -427,21 +434,6 @@ std::int64_t Track::highestUserId() const
     for (const HostEvent& event : clipEvents())
         highest = std::max(highest, event.getUserId());
     return highest;
-}
-
-std::vector<Counted<IProjectNode>> Track::childrenStartingIn(double start, double end) const
-{
-    const auto node = requiredNode();
-    if (start > end)
-        throw Result::InvalidArgument;
-    const double from = start - timeOrigin();
-    const double to = end - timeOrigin();
-    std::vector<Counted<IProjectNode>> children = childrenOf(*node);
-    std::erase_if(children, [from, to, times = container()](const Counted<IProjectNode>& child) {
-        const core::SecondsRange span = orderedSpanOf(*child, times.get());
-        return isBefore(span.start, from) || !isBefore(span.start, to);
-    });
-    return children;
 }
 
 void Track::removeChildren(IEditTransaction& transaction, const std::vector<Counted<IProjectNode>>& children)

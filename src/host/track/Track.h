@@ -59,10 +59,11 @@ public:
     std::wstring getName() const;
     void setName(const std::wstring& name);
 
-    /// What the system uses the track for, a TrackRole: -1 when it isn't said. All three throw Result::NotSupported for
+    /// What the system uses the track for, a TrackRole: -1 when it isn't said. All four throw Result::NotSupported for
     /// a track that is neither a marker track, a video track nor a folder.
     std::int32_t role() const;
     void setRole(std::int32_t role);
+    void removeRole();
     /// Whether it has a role that equals `role` in the bits of the mask.
     bool hasRole(std::int32_t role, std::int32_t mask) const;
 
@@ -100,8 +101,6 @@ public:
     /// Removes the events that lie in the range whole, in seconds of the project's clock. A point at the start lies in
     /// it, a point at the end doesn't.
     void removeRange(Velmark::IEditTransaction& transaction, double start, double end);
-    /// Removes the events that start in the range, also those that end after it; else as removeRange.
-    void removeStartingIn(Velmark::IEditTransaction& transaction, double start, double end);
 
     /// What stands on the track now. Throws Result::HostObjectMissing without a track.
     TrackIndex readIndex() const;
@@ -128,9 +127,6 @@ private:
     std::optional<std::int64_t> integerAttribute(const char* key) const;
     /// 0 when none has an id.
     std::int64_t highestUserId() const;
-    /// The children that start in a range, in seconds of the project's clock. Throws Result::InvalidArgument for a
-    /// reversed one.
-    std::vector<Velmark::Counted<Velmark::IProjectNode>> childrenStartingIn(double start, double end) const;
     void removeChildren(Velmark::IEditTransaction& transaction,
                         const std::vector<Velmark::Counted<Velmark::IProjectNode>>& children);
     void noteChange();

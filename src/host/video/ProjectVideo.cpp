@@ -34,14 +34,13 @@ void ProjectVideo::setProject(Project* project)
     }
 }
 
-void ProjectVideo::apply(bool write, Velmark::IEditTransaction& transaction, double offset)
+bool ProjectVideo::apply(bool write, Velmark::IEditTransaction& transaction, double offset)
 {
     if (!m_project)
-        return;
+        return true;
     m_trackHandler.rebuild(m_project);
     m_writer.setOffset(offset);
-    if (write)
-        m_writer.writeVideoEvents(transaction);
+    return !write || m_writer.writeVideoEvents(transaction);
 }
 
 } // namespace cadrel::host

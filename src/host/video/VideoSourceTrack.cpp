@@ -31,15 +31,17 @@ VideoSourceTrack::~VideoSourceTrack()
     m_handler.removeListener(this);
 }
 
-void VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
+bool VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
 {
     const core::VideoList* const list = m_source.videoList();
-    if (!list || list->isEmpty() || !m_track.isAlive() || m_track.hostLocked())
-        return;
+    if (!list || list->isEmpty() || !m_track.isAlive() || VideoTrackHandler::isTurnedOff(m_track))
+        return true;
+    if (m_track.hostLocked())
+        return false;
     clear(transaction);
     MediaPool* const pool = m_source.mediaPool();
-    if (!pool || VideoTrackHandler::isTurnedOff(m_track))
-        return;
+    if (!pool)
+        return true;
     for (const core::VideoList::Entry& entry : list->entries()) {
         HostEvent event(m_track, required(create<IProjectNode>(m_hostContext, ClassId::ClipEvent)));
         const double start = m_offset + entry.start.toSeconds();
@@ -48,6 +50,7 @@ void VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
         event.setClip(pool->findClip(entry).get(), 0);
         requireOk(transaction.insert(m_track.container().get(), event.node()));
     }
+    return true;
 }
 
 void VideoSourceTrack::clear(IEditTransaction& transaction)

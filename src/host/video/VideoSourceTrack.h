@@ -29,10 +29,10 @@ public:
 
     /// How much later than in the list the videos are written, in seconds.
     void setOffset(double seconds) { m_offset = seconds; }
-    /// Replaces what stands on the track by the videos of the list; does nothing for an empty one, nor on a track that the
-    /// user has locked. With an offset only what starts there or later is replaced, because the real programme isn't
-    /// written. A track on which the user has put another video is only emptied.
-    void writeVideoEvents(Velmark::IEditTransaction& transaction);
+    /// Replaces what stands on the track by the videos of the list; does nothing for an empty one, nor on a track on which
+    /// the user has put another video. With an offset only what starts there or later is replaced, because the real
+    /// programme isn't written. False when there are videos and the user has locked the track, which stays as it is then.
+    bool writeVideoEvents(Velmark::IEditTransaction& transaction);
 
     void tracksChanged() override;
 

@@ -34,6 +34,12 @@ bool hasPicture(const Track& track)
     return picture == TrackRole::OldVideo || picture == TrackRole::NewVideo;
 }
 
+/// What the user has said about a picture of the track stays.
+void givePicture(Track& track, std::int32_t picture)
+{
+    track.setRole(picture | (hasPicture(track) ? track.role() & TrackRole::OwnVideo : 0));
+}
+
 std::int32_t roleOf(std::int32_t mode)
 {
     using Mode = VideoTrackHandler::Mode;
@@ -81,12 +87,15 @@ std::int32_t VideoTrackHandler::getMode(std::size_t channel)
 void VideoTrackHandler::setMode(std::size_t channel, std::int32_t mode)
 {
     Track& changed = track(channel);
+    const bool wasNew = pictureOf(changed) == TrackRole::NewVideo;
     changed.setRole(roleOf(mode));
-    if (mode == Mode::Old || mode == Mode::New) {
-        Track& other = track(ChannelCount - 1 - channel);
-        if (other.isAlive())
-            other.setRole(roleOf(mode == Mode::Old ? Mode::New : Mode::Old));
-    }
+    Track& other = track(ChannelCount - 1 - channel);
+    if (mode == Mode::New && other.isAlive())
+        givePicture(other, TrackRole::OldVideo);
+    else if (mode == Mode::Old && pictureOf(other) == TrackRole::OldVideo)
+        // What stands on the track of the new picture is replaced by runs. So it is one that was named for a picture
+        // before, and gets this one in exchange.
+        wasNew ? givePicture(other, TrackRole::NewVideo) : other.removeRole();
     tellListeners();
 }
 

@@ -640,7 +640,10 @@ core::GenerationFailure failureOf(const EventList& oldEvents, const EventList& n
 {
     std::vector<core::GenerationFailure> failures;
     EventList changes;
-    const auto listener = [&](const core::GenerationFailure& failure) { failures.push_back(failure); };
+    const auto listener = [&](const core::GenerationFailure& failure) {
+        failures.push_back(failure);
+        return core::FailureAnswer::Stop;
+    };
     EXPECT_EQ(thrownBy([&] { ChangeEdlGenerator().generate(oldEvents, newEvents, changes, listener); }),
               Result::OutOfRange);
     EXPECT_EQ(failures.size(), 1U);
@@ -681,6 +684,115 @@ TEST(ChangeEdlGenerator, AFailureTellsTheTwoEventsThatCantBeBroughtTogether)
     const core::GenerationFailure lateInOld = failureOf(listOf({early, late, fine}), listOf({early}));
     EXPECT_EQ(lateInOld.oldEvent, late) << "of twins, the one that leaves the day";
     EXPECT_EQ(lateInOld.newEvent, early);
+}
+
+/// What a generation that passes over its failures gives.
+struct Passed {
+    Passed(const std::vector<Event>& oldEvents, const std::vector<Event>& newEvents)
+    {
+        const auto listener = [&](const core::GenerationFailure& failure) {
+            failures.push_back(failure);
+            return core::FailureAnswer::PassOver;
+        };
+        EventList changes;
+        EXPECT_EQ(ChangeEdlGenerator().generate(listOf(oldEvents), listOf(newEvents), changes, listener), Result::Ok);
+        lines = linesOf(changes);
+    }
+
+    std::vector<core::GenerationFailure> failures;
+    Lines lines;
+};
+
+TEST(ChangeEdlGenerator, AnEventWhoseTransitionCantBeCutOutIsPassedOverWhereThatIsWanted)
+{
+    const TestProject project;
+    const auto endless = [] {
+        return makeTransition(TransitionType::Wipe, 9999999,
+                              makeEvent("A", "00:01:00:00", "00:01:10:00", "01:00:00:00", "01:00:10:00"));
+    };
+    const Event oldEndless = endless();
+    const Event newEndless = endless();
+    const Event plain = makeEvent("B", "00:01:00:00", "00:01:10:00", "01:00:10:00", "01:00:20:00");
+
+    const Passed passed({oldEndless, plain}, {newEndless, plain});
+
+    EXPECT_EQ(passed.lines, (Lines{"1 B 01:00:10:00 01:00:20:00 01:00:10:00 01:00:20:00"}));
+    ASSERT_EQ(passed.failures.size(), 2U);
+    EXPECT_EQ(passed.failures[0].oldEvent, oldEndless);
+    EXPECT_EQ(passed.failures[1].newEvent, newEndless);
+    EXPECT_FALSE(newEndless->hasFlaw(core::EventFlaw::TransitionDurationInvalid)) << "the inputs stay as they are";
+}
+
+TEST(ChangeEdlGenerator, OfTwinsThoseThatStayWithinTheDayAreMatchedWhereTheOthersArePassedOver)
+{
+    const TestProject project;
+    const Event early = makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00");
+    const Event late = makeEvent("A", "00:01:00:00", "00:01:08:01", "23:59:51:24", "23:59:59:24");
+    const Lines matched{"1 A 01:00:00:00 01:00:08:01 01:00:00:00 01:00:08:01"};
+
+    for (const std::vector<Event>& oldEvents : {std::vector{early, late}, std::vector{late, early}}) {
+        const Passed passed(oldEvents, {early});
+
+        EXPECT_EQ(passed.lines, matched);
+        ASSERT_EQ(passed.failures.size(), 1U);
+        EXPECT_EQ(passed.failures[0].oldEvent, late);
+        EXPECT_EQ(passed.failures[0].newEvent, early);
+    }
+}
+
+TEST(ChangeEdlGenerator, AnEventThatLeavesTheDayWithAllOfItsTwinsIsPassedOver)
+{
+    const TestProject project;
+    const Event early = makeEvent("A", "00:01:00:00", "00:01:08:01", "01:00:00:00", "01:00:08:00");
+    const Event late = makeEvent("A", "00:01:00:00", "00:01:08:01", "23:59:51:24", "23:59:59:24");
+    const Event fine = makeEvent("B", "00:01:00:00", "00:01:10:00", "00:59:00:00", "00:59:10:00");
+
+    const Passed passed({early, fine}, {fine, late});
+
+    EXPECT_EQ(passed.lines, (Lines{"1 B 00:59:00:00 00:59:10:00 00:59:00:00 00:59:10:00"}));
+    EXPECT_EQ(passed.failures.size(), 1U);
+}
+
+Event reversed(const Event& event)
+{
+    event->setReversed(true);
+    return event;
+}
+
+TEST(ChangeEdlGenerator, AReversedShotMatchesOnlyAReversedOne)
+{
+    const TestProject project;
+    const auto shot = [] { return makeEvent("A", "10:00:00:00", "10:00:10:00", "02:00:00:00", "02:00:10:00"); };
+
+    EXPECT_EQ(linesOf(generated({shot()}, {reversed(shot())})), Lines{});
+    EXPECT_EQ(linesOf(generated({reversed(shot())}, {shot()})), Lines{});
+    EXPECT_EQ(linesOf(generated({reversed(shot())}, {reversed(shot())})),
+              Lines{"1 A 02:00:00:00 02:00:10:00 02:00:00:00 02:00:10:00"});
+}
+
+//  source          |10:00:00 .......... 10:00:08 .. 10:00:10|
+//  old programme    <------------------------------ plays ---
+//  new programme    <------------------ plays ---
+TEST(ChangeEdlGenerator, AReversedShotThatBeginsLaterLosesTheEndOfItsSource)
+{
+    const TestProject project;
+    const Event oldShot = reversed(makeEvent("A", "10:00:00:00", "10:00:10:00", "02:00:00:00", "02:00:10:00"));
+    const Event newShot = reversed(makeEvent("A", "10:00:00:00", "10:00:08:00", "01:00:00:00", "01:00:08:00"));
+
+    EXPECT_EQ(linesOf(generated({oldShot}, {newShot})), Lines{"1 A 02:00:02:00 02:00:10:00 01:00:00:00 01:00:08:00"});
+}
+
+TEST(ChangeEdlGenerator, ADissolveIntoAReversedShotIsCutOffTheEndOfItsSource)
+{
+    const TestProject project;
+    const auto dissolve = [](const Event& event) {
+        return makeTransition(TransitionType::Dissolve, 25, reversed(event));
+    };
+    const Event oldShot = dissolve(makeEvent("A", "10:00:00:00", "10:00:10:00", "02:00:00:00", "02:00:10:00"));
+    const Event newShot = dissolve(makeEvent("A", "10:00:02:00", "10:00:10:00", "01:00:00:00", "01:00:08:00"));
+
+    EXPECT_EQ(linesOf(generated({oldShot}, {newShot})), (Lines{"1 A 02:00:00:00 02:00:01:00 01:00:00:00 01:00:01:00",
+                                                               "2 A 02:00:01:00 02:00:08:00 01:00:01:00 01:00:08:00"}));
 }
 
 TEST(ChangeEdlGenerator, AnInvalidEventWhoseTransitionCannotBeCutOutTakesNoPart)

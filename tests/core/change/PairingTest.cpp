@@ -376,6 +376,61 @@ RC_GTEST_PROP(Pairing, LargerFilmsGiveWhatPairingOneByOneGives, ())
 
 namespace {
 
+/// Twice the place in the source that stays where it is when a list is played backwards.
+constexpr int Mirror = 400000;
+
+/// The same programme of material that was shot the other way round, so that each shot has to be reversed.
+EventList mirrored(const EventList& list)
+{
+    EventList copy;
+    copy.copyFrom(list);
+    for (const auto& event : copy.events()) {
+        event->setSrc(Timecode(Mirror - event->srcOut().toFrameCount()),
+                      Timecode(Mirror - event->srcIn().toFrameCount()));
+        event->setReversed(true);
+    }
+    return copy;
+}
+
+/// Near the ends of the day a transition of impossible length fails on one side alone.
+bool canBeMirrored(const EventList& list)
+{
+    return std::all_of(list.events().begin(), list.events().end(), [](const auto& event) {
+        return event->isValid() && event->srcOut().toFrameCount() < Mirror / 2 && event->transitionDuration() < Mirror;
+    });
+}
+
+std::vector<std::string> allTimecodesOf(const EventList& list)
+{
+    std::vector<std::string> timecodes;
+    for (const auto& event : list.events())
+        timecodes.push_back(timecodesOf(*event));
+    return timecodes;
+}
+
+} // namespace
+
+RC_GTEST_PROP(Pairing, ReversedShotsOfMirroredMaterialGiveWhatTheShotsGive, ())
+{
+    const Film film(*anyFilm(40));
+    const TestProject project(film.framerate);
+    RC_PRE(canBeMirrored(film.oldEvents) && canBeMirrored(film.newEvents));
+    ChangeEdlGenerator generator;
+    generator.configure(film.matchBy, film.vfxRows);
+    const auto passOver = [](const core::GenerationFailure&) { return core::FailureAnswer::PassOver; };
+    EventList changes;
+    generator.generate(film.oldEvents, film.newEvents, changes, passOver);
+
+    EventList mirroredChanges;
+    generator.generate(mirrored(film.oldEvents), mirrored(film.newEvents), mirroredChanges, passOver);
+
+    if (allTimecodesOf(mirroredChanges) != allTimecodesOf(changes))
+        RC_FAIL("old\n" + textOf(film.oldEvents) + "new\n" + textOf(film.newEvents) + "gives\n" + textOf(changes) +
+                "reversed\n" + textOf(mirroredChanges));
+}
+
+namespace {
+
 constexpr double AmpleSeconds = IsSanitized ? 60.0 : IsOptimized ? 2.0 : 10.0;
 constexpr int ManyEvents = 20000;
 constexpr int ShotLength = 100;

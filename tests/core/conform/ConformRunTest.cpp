@@ -257,7 +257,7 @@ TEST(ConformRun, WritesTheMarkersOfAllKindsInTheOrderInWhichTheyAreLookedFor)
     EXPECT_EQ(film.conform(), Result::Ok);
 
     const Markers markers = film.engine.markers();
-    ASSERT_EQ(markers.size(), 5U);
+    ASSERT_EQ(markers.size(), 6U);
     EXPECT_EQ(markers[0], (MarkerEntry{38.0, 42.0, "Insert: NEWROLL", MarkerKind::Insert}));
     EXPECT_EQ(markers[1], (MarkerEntry{36.0, 38.0, "D 5 NEWROLL", MarkerKind::DissolveWipe}));
     EXPECT_EQ(markers[2].start, 0.0);
@@ -265,7 +265,8 @@ TEST(ConformRun, WritesTheMarkersOfAllKindsInTheOrderInWhichTheyAreLookedFor)
     EXPECT_EQ(markers[2].name, "Audio snippet in Dialogue");
     EXPECT_EQ(markers[2].kind, MarkerKind::AudioSnippet);
     EXPECT_EQ(markers[3], (MarkerEntry{20.0, 20.0, "Automation warning in Dialogue ", MarkerKind::AutomationWarning}));
-    EXPECT_EQ(markers[4], (MarkerEntry{28.0, 30.0, "Overlap in Dialogue ", MarkerKind::Overlap}));
+    EXPECT_EQ(markers[4], (MarkerEntry{28.0, 28.0, "Automation warning in Dialogue ", MarkerKind::AutomationWarning}));
+    EXPECT_EQ(markers[5], (MarkerEntry{28.0, 30.0, "Overlap in Dialogue ", MarkerKind::Overlap}));
 }
 
 } // namespace

@@ -159,6 +159,26 @@ TEST(CmxWriter, CutsTheTitleToSeventyCharacters)
     EXPECT_EQ(titleOf(seventy + "x"), "TITLE:   " + seventy);
 }
 
+TEST(CmxWriter, SaysDropFrameAfterEachTitleWhereItIsAskedFor)
+{
+    const TestProject project(Framerate(30, 1));
+    const TempFolder folder;
+
+    EXPECT_EQ(CmxWriter(CmxWriter::FrameCountMode::DropFrame).write(widePath(folder / "reel.edl"), listOfCuts(1000)),
+              Result::Ok);
+
+    for (const char* const part : {"reel_1.edl", "reel_2.edl"}) {
+        const std::string beginning = std::string("TITLE:   ") + part + "\nFCM: DROP FRAME\n001  AX ";
+        EXPECT_TRUE(contentOf(folder / part).starts_with(beginning)) << part;
+        EventList events;
+        Framerate shown;
+        EXPECT_EQ(CmxParser().parse(widePath(folder / part), events, shown, false), Result::Ok);
+        EXPECT_EQ(shown.dropFrame, 1);
+        EXPECT_EQ(shown.framesPerSecond, 30);
+    }
+    EXPECT_EQ(textOf(listOfCuts(1)).find("FCM"), std::string::npos);
+}
+
 TEST(CmxWriter, WritesAPrintableTitle)
 {
     EXPECT_EQ(titleOf("a\tb\x7F"

@@ -44,6 +44,11 @@ public:
 
     bool recognises(std::string_view beginning) const override { return beginning.starts_with("SHOTS"); }
     std::optional<SourceLine> rateLine() const override { return SourceLine{1, "SHOTS"}; }
+    void readThoroughly() override {}
+    const core::fileio::FileRemarks& remarks() const override { return m_remarks; }
+
+private:
+    core::fileio::FileRemarks m_remarks;
 };
 
 template <class Parser>

@@ -67,6 +67,28 @@ protected:
 
 } // namespace
 
+TEST_F(PictureLineTest, AReversedShotIsEqualToAReversedOneThatShowsTheSameFrames)
+{
+    const auto reversed = [](EventList events) {
+        events.at(0).setReversed(true);
+        return events;
+    };
+    const EventList forwards = Film().at(100).shot("A", 0, 50).list();
+
+    EXPECT_EQ(equalOf(forwards, reversed(Film().at(100).shot("A", 0, 50).list())), Lines{});
+    EXPECT_EQ(
+        equalOf(reversed(Film().at(100).shot("A", 0, 50).list()), reversed(Film().at(100).shot("A", 0, 50).list())),
+        Lines{"100..150"});
+    // Both begin with the last frame of the source.
+    EXPECT_EQ(
+        equalOf(reversed(Film().at(100).shot("A", 0, 50).list()), reversed(Film().at(100).shot("A", 10, 40).list())),
+        Lines{"100..140"});
+    // An event list may also tell the way of a reversed shot by its SRC.
+    EXPECT_EQ(
+        equalOf(Film().at(100).retimed("A", 50, -50, 50).list(), reversed(Film().at(100).shot("A", 0, 50).list())),
+        Lines{"100..150"});
+}
+
 TEST_F(PictureLineTest, LayersStandTogetherWhereTheyOverlap)
 {
     const Film film = Film().at(100).shot("A", 0, 50).shot("B", 0, 50).at(140).shot("T", 0, 20);

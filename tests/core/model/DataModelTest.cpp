@@ -385,7 +385,10 @@ TEST_F(Model, AFailureThatIsDueToAnEventTellsWhichOneItIs)
     model.newEdl().add(endless);
     GenerationFailure failure;
 
-    const Result::Type result = model.generateChangeEdl([&](const GenerationFailure& told) { failure = told; });
+    const Result::Type result = model.generateChangeEdl([&](const GenerationFailure& told) {
+        failure = told;
+        return core::FailureAnswer::Stop;
+    });
 
     EXPECT_EQ(result, Result::OutOfRange);
     EXPECT_EQ(failure.newEvent, endless);
@@ -398,7 +401,11 @@ TEST_F(Model, AFailureThatIsDueToNoEventTellsNone)
     fill();
     model.settings().setVfxPattern(VfxPatternEntry("A/B", "", true), 1);
 
-    EXPECT_EQ(model.generateChangeEdl([](const GenerationFailure&) { ADD_FAILURE(); }), Result::InvalidArgument);
+    EXPECT_EQ(model.generateChangeEdl([](const GenerationFailure&) {
+        ADD_FAILURE();
+        return core::FailureAnswer::PassOver;
+    }),
+              Result::InvalidArgument);
 }
 
 TEST_F(Model, AFailureOfTheGeneratorEmptiesTheChangeListAndIsTheResult)
@@ -456,7 +463,8 @@ TEST_F(Model, AnExceptionOfWhoIsToldOfAFailureLeavesTheModelListening)
     endless->setTransitionDuration(9999999);
     model.newEdl().add(endless);
 
-    EXPECT_THROW(model.generateChangeEdl([](const GenerationFailure&) { throw std::runtime_error("out of order"); }),
+    EXPECT_THROW(model.generateChangeEdl(
+                     [](const GenerationFailure&) -> core::FailureAnswer { throw std::runtime_error("out of order"); }),
                  std::runtime_error);
 
     EXPECT_TRUE(isListening());

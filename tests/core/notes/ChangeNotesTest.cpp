@@ -262,6 +262,30 @@ TEST_F(ChangeNotesTest, AnotherSpeedIsARetime)
     EXPECT_EQ(textOf(film.steps()), Texts{"-50 +25 at 100: retimed 25;"});
 }
 
+/// The reel with one of its shots played backwards.
+EventList withReversed(EventList reel, std::size_t shot)
+{
+    reel.at(shot).setReversed(true);
+    return reel;
+}
+
+TEST_F(ChangeNotesTest, AShotThatIsPlayedBackwardsNowIsARetime)
+{
+    const std::vector<Shot> shots{{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 10}};
+    const Notes film(reelOf(shots), withReversed(reelOf(shots), 1));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-50 +50 at 100: retimed 50;"});
+    EXPECT_TRUE(Notes(withReversed(reelOf(shots), 1), withReversed(reelOf(shots), 1)).steps().empty());
+}
+
+TEST_F(ChangeNotesTest, AReversedShotIsTrimmedAtItsHeadWhereItsSourceEndsEarlier)
+{
+    const Notes film(withReversed(reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 10}}), 1),
+                     withReversed(reelOf({{"A", 0, 100}, {"B", 0, 40}, {"C", 0, 10}}), 1));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-10 +0 at 100: head -10;"});
+}
+
 TEST_F(ChangeNotesTest, AnotherVersionOfAVfxShotIsAStepThatMovesNothing)
 {
     const Notes film(reelOf({{"A", 0, 100}, {"VFX_1", 0, 50}}), reelOf({{"A", 0, 100}, {"VFX_2", 0, 50}}), 0, "VFX_");

@@ -21,6 +21,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <functional>
 #include <initializer_list>
@@ -254,6 +255,32 @@ TEST_P(ProjectEditsTest, ACutLeavesOutTheMarkersOfRuns)
     const std::vector<std::wstring> tracks = tracksOf(*host.adapter.makeCut(tenSeconds()));
 
     EXPECT_EQ(tracks, (std::vector<std::wstring>{L"FX", L"Memos", L"Cues"}));
+}
+
+TEST_P(ProjectEditsTest, ACutLeavesOutTheMarkersOfRunsThatAreSwitchedOffInAProjectThatWasOpenedAnew)
+{
+    addTrack(u"FX");
+    createMarkerTracks();
+    host.addTrack(TypeWord::Marker, u"Cues");
+    Project reopened(host.context(), host.document());
+    switchMarkersOff(reopened.model().settings());
+
+    EXPECT_EQ(tracksOf(*reopened.makeCut(tenSeconds())), (std::vector<std::wstring>{L"FX", L"Memos", L"Cues"}));
+}
+
+TEST_P(ProjectEditsTest, ARunEmptiesTheMarkersThatAreSwitchedOffInAProjectThatWasOpenedAnew)
+{
+    createMarkerTracks();
+    const auto destinations = markerTrack(u"Destination");
+    host.addRangeMarker(destinations, u"old", film(2.0), film(8.0));
+    Project reopened(host.context(), host.document());
+    reopened.computePreviewOffset();
+    switchMarkersOff(reopened.model().settings());
+    reopened.model().settings().setApplyTo(core::ApplyTo::SelectedTracks);
+
+    host.edit(u"Edit", [&] { reopened.completeApply(*host.transaction()); });
+
+    EXPECT_EQ(contentOf(destinations), Content());
 }
 
 TEST_P(ProjectEditsTest, TheEventsOfACutSeeWhatStandsOnTheirTracks)
@@ -569,8 +596,11 @@ TEST_P(ProjectEditsTest, ARestrictedRunReplacesItsRangeAlone)
 }
 
 //     range                      10|=============|20
-//     markers of runs    |--a--|--b--|--c--|  |--d--|--e--|     c and d go, b ends where the range begins
-TEST_P(ProjectEditsTest, ARestrictedRunRemovesTheMarkersOfRunsThatStartInItsRange)
+//     before             |--a--|--b--|--c--|  |--d--|--e--|
+//                             |----------- f ----------|
+//     after              |--a--|-b-|      |new|  |d|--e--|     what stands outside of the range wasn't conformed anew, and
+//                             |-f--|             |--f--|       its markers still tell the truth
+TEST_P(ProjectEditsTest, ARestrictedRunEmptiesItsRangeOfTheMarkersOfRunsAndCutsThoseThatReachOutOfIt)
 {
     createMarkerTracks();
     for (const char16_t* const name : {u"Destination", u"Memos"}) {
@@ -580,6 +610,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunRemovesTheMarkersOfRunsThatStartInItsRang
         host.addRangeMarker(track, u"c", film(10.0), film(15.0));
         host.addRangeMarker(track, u"d", film(18.0), film(22.0));
         host.addRangeMarker(track, u"e", film(20.0), film(25.0));
+        host.addRangeMarker(track, u"f", film(7.0), film(24.0));
         host.addRangeMarker(track, u"new", film(Day + 16.0), film(Day + 20.0));
     }
     settings().setRestrictRange(true);
@@ -587,8 +618,28 @@ TEST_P(ProjectEditsTest, ARestrictedRunRemovesTheMarkersOfRunsThatStartInItsRang
 
     EXPECT_EQ(complete(), Result::Ok);
 
-    EXPECT_EQ(contentOf(markerTrack(u"Destination")), (Content{"a 0-8", "b 8-10", "new 16-20", "e 20-25"}));
-    EXPECT_EQ(contentOf(markerTrack(u"Memos")), (Content{"a 0-8", "b 8-10", "new 16-20", "e 20-25", "d 20-22"}));
+    for (const char16_t* const name : {u"Destination", u"Memos"}) {
+        Content content = contentOf(markerTrack(name));
+        std::ranges::sort(content);
+        EXPECT_EQ(content, (Content{"a 0-8", "b 8-10", "d 20-22", "e 20-25", "f 20-24", "f 7-10", "new 16-20"}));
+    }
+}
+
+TEST_P(ProjectEditsTest, ARestrictedRunThatIsMadeAgainPilesUpNoMarkers)
+{
+    createMarkerTracks();
+    const auto destinations = markerTrack(u"Destination");
+    host.addRangeMarker(destinations, u"old", film(8.0), film(22.0));
+    settings().setRestrictRange(true);
+    settings().setPreserveMaterial(3610.0, 3620.0);
+
+    for (int run = 0; run < 3; ++run) {
+        host.addRangeMarker(destinations, u"new", film(Day + 16.0), film(Day + 24.0));
+        EXPECT_EQ(complete(), Result::Ok);
+        Content content = contentOf(destinations);
+        std::ranges::sort(content);
+        EXPECT_EQ(content, (Content{"new 16-20", "old 20-22", "old 8-10"}));
+    }
 }
 
 TEST_P(ProjectEditsTest, ARestrictedRunMayBeginBeforeTheClock)
@@ -777,7 +828,7 @@ protected:
     {
         cuts.clear();
         for (const auto& [dstIn, dstOut] : destinations)
-            cuts.add(host.adapter.makeCut(change("01:00:00:00", "01:00:10:00", dstIn, dstOut)));
+            cuts.add(host.adapter.makeCut(change(dstIn, dstOut, dstIn, dstOut)));
     }
 
     Result::Type mark()
@@ -938,13 +989,13 @@ TEST_P(ProjectVirginTerritoryTest, AutomationHasItsFirstValueBeforeTheFirstCut)
     EXPECT_EQ(points(track), (std::vector<double>{-3600.0, -3600.0, 30.0, 35.0, 45.0}));
 }
 
-TEST_P(ProjectVirginTerritoryTest, AutomationKeepsItsLastValueAfterTheLastCutOfARun)
+TEST_P(ProjectVirginTerritoryTest, AutomationKeepsItsLastValueAfterTheLastCut)
 {
-    const std::vector<double> before = points(track);
     listCuts({{"01:00:10:00", "01:00:20:00"}});
 
     hold(false);
-    EXPECT_EQ(points(track), before);
+    // In a preview up to a second before the end of what is cleared.
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, Day - 3601.0, Day - 3601.0}));
 
     hold(true);
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0}));
@@ -962,6 +1013,18 @@ TEST_P(ProjectVirginTerritoryTest, ARestrictedRunHoldsTheAutomationInItsRange)
     settings().setPreserveMaterial(3635.0, 3640.0);
     listCuts({{"01:00:40:00", "01:00:50:00"}});
     hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, ACutIsAsLongAsItsMaterial)
+{
+    cuts.clear();
+    cuts.add(host.adapter.makeCut(change("01:00:00:00", "01:00:10:00", "01:00:10:00", "01:00:30:00")));
+    cuts.add(host.adapter.makeCut(change("01:00:10:00", "01:00:20:00", "01:00:30:00", "01:00:40:00")));
+
+    hold();
+
+    // From 20 s on there is nothing, though the first one is to last longer.
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
 }
 

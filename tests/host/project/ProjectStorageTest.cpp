@@ -5,6 +5,7 @@
 #include "host/border/HostFailure.h"
 #include "host/undo/DataModelEditStep.h"
 #include "standin/base/AttributeList.h"
+#include "tests/host/project/AlteredDocument.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/EventMaking.h"
@@ -12,6 +13,7 @@
 #include "tests/support/core/TestProject.h"
 #include "tests/support/host/AlteredContext.h"
 #include "tests/support/host/FakeProject.h"
+#include "tests/support/host/HostedModel.h"
 #include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
 
@@ -19,7 +21,8 @@
 
 #include <cstdint>
 #include <filesystem>
-#include <set>
+#include <map>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -34,6 +37,7 @@ using cadrel::util::Result;
 namespace cadrel::host {
 
 using tests::AlteredContext;
+using tests::AlteredDocument;
 using tests::FakeProject;
 using tests::TrackHost;
 
@@ -62,24 +66,27 @@ struct UnreliableProject : FakeProject {
 
     /// What is stored under all keys.
     FVariant value;
+    bool isReadable = false; ///< whether it says so of all keys
     int32 readResult = ResultOk;
-    std::string refusedKey;
-    std::set<std::string> keptKeys;
+    std::string refusedKey; ///< once
+    std::map<std::string, FVariant> kept;
 
-    int32 hasAttribute(const char*) override { return ResultOk; }
-    int32 getAttribute(const char*, FVariant& out) override
+    int32 hasAttribute(const char* key) override { return isReadable || kept.contains(key) ? ResultOk : ResultFalse; }
+    int32 getAttribute(const char* key, FVariant& out) override
     {
-        out = value;
+        out = kept.contains(key) ? kept.at(key) : value;
         return readResult;
     }
-    int32 setAttribute(const char* key, const FVariant&, bool) override
+    int32 setAttribute(const char* key, const FVariant& attribute, bool) override
     {
-        if (key == refusedKey)
+        if (key == refusedKey) {
+            refusedKey.clear();
             return ResultFalse;
-        keptKeys.insert(key);
+        }
+        kept[key] = attribute;
         return ResultOk;
     }
-    int32 removeAttribute(const char* key) override { return keptKeys.erase(key) == 1 ? ResultOk : ResultFalse; }
+    int32 removeAttribute(const char* key) override { return kept.erase(key) == 1 ? ResultOk : ResultFalse; }
 };
 
 class ProjectStorageTest : public testing::Test {
@@ -322,6 +329,7 @@ TEST_F(ProjectStorageTest, WhatIsStoredHasToBeAList)
                                   FVariant::object(nullptr), FVariant::object(host.document())}) {
         const auto project = makeCounted<UnreliableProject>();
         project->value = value;
+        project->isReadable = true;
         EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).load(); }), Result::HostObjectMissing);
     }
 }
@@ -338,6 +346,7 @@ TEST_F(ProjectStorageTest, TheListHasToHoldTheBlock)
 TEST_F(ProjectStorageTest, FailsWhereTheHostGivesNothing)
 {
     const auto project = makeCounted<UnreliableProject>();
+    project->isReadable = true;
     project->value = FVariant::object(query<IAttributeData>(makeCounted<StubbornList>()).get());
     EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).load(); }), Result::HostCallFailed);
 
@@ -349,38 +358,85 @@ TEST_F(ProjectStorageTest, FailsWhereTheHostGivesNothing)
     EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).save(); }), Result::HostObjectMissing);
 }
 
-TEST_F(ProjectStorageTest, ASaveThatFailsLeavesNothingStored)
+TEST_F(ProjectStorageTest, ASaveThatFailsLeavesWhatWasStored)
 {
     host.adapter.save();
+    const Bytes before = storedBlock();
     AlteredContext altered(host.context());
     Project project(&altered, host.document());
 
     altered.hide(IAttributeData::iid);
     EXPECT_EQ(thrownBy([&] { project.save(); }), Result::HostObjectMissing);
-    EXPECT_NE(host.root()->hasAttribute(AttributeKey::Storage), ResultOk);
-    EXPECT_NE(host.root()->hasAttribute(AttributeKey::StorageChecksum), ResultOk);
+    EXPECT_EQ(storedBlock(), before);
+    AlteredContext stubborn(host.context());
+    stubborn.replace(IAttributeData::iid, makeCounted<StubbornList>());
+    EXPECT_EQ(thrownBy([&] { Project(&stubborn, host.document()).save(); }), Result::HostCallFailed);
+    EXPECT_EQ(storedBlock(), before);
+    project.model().changeEdl().add(std::make_shared<tests::UnwritableEvent>());
+    EXPECT_EQ(thrownBy([&] { project.save(); }), Result::OutOfRange);
+    EXPECT_EQ(storedBlock(), before);
 
-    EXPECT_EQ(loadFailure(), Result::Ok) << "as in a project that never was stored";
+    Project opened(host.context(), host.document());
+    opened.load();
+    EXPECT_EQ(contentOf(opened.model()), before);
 }
 
-TEST_F(ProjectStorageTest, ASaveFailsWhereTheHostTakesNothing)
+TEST_F(ProjectStorageTest, PreviewedEventsThatCannotBeStoredKeepTheModelFromNothing)
 {
-    AlteredContext altered(host.context());
-    altered.replace(IAttributeData::iid, makeCounted<StubbornList>());
-    EXPECT_EQ(thrownBy([&] { Project(&altered, host.document()).save(); }), Result::HostCallFailed);
+    host.adapter.model().setPreviewActive(true);
+    host.adapter.previewEvents().add(std::make_shared<tests::UnwritableEvent>());
 
+    EXPECT_EQ(thrownBy([&] { host.adapter.save(); }), Result::OutOfRange) << "It is told all the same.";
+
+    EXPECT_EQ(storedBlock(), contentOf(host.adapter.model()));
+    Project opened(host.context(), host.document());
+    opened.load();
+    EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
+    EXPECT_TRUE(opened.previewEvents().isEmpty());
+}
+
+TEST_F(ProjectStorageTest, PutsBackWhatWasStoredWhereTheHostTakesHalfOfIt)
+{
     const auto project = makeCounted<UnreliableProject>();
-    project->refusedKey = AttributeKey::Storage;
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).save(); }), Result::HostCallFailed);
-    EXPECT_TRUE(project->keptKeys.empty());
-
-    project->refusedKey = AttributeKey::StorageChecksum;
-    EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).save(); }), Result::HostCallFailed);
-    EXPECT_TRUE(project->keptKeys.empty());
+    const auto storedAfterRefusalOf = [&](const char* key) {
+        project->refusedKey = key;
+        EXPECT_EQ(thrownBy([&] { Project(host.context(), project.get()).save(); }), Result::HostCallFailed);
+        return project->kept;
+    };
+    using Kept = std::map<std::string, FVariant>;
+    EXPECT_TRUE(storedAfterRefusalOf(AttributeKey::Storage).empty());
+    EXPECT_TRUE(storedAfterRefusalOf(AttributeKey::StorageChecksum).empty()) << "A block alone would count as damaged.";
 
     project->refusedKey = "";
     Project(host.context(), project.get()).save();
-    EXPECT_EQ(project->keptKeys, (std::set<std::string>{AttributeKey::Storage, AttributeKey::StorageChecksum}));
+    const Kept stored = project->kept;
+    ASSERT_EQ(stored.size(), 2U);
+    for (const char* const key : {AttributeKey::Storage, AttributeKey::StorageChecksum}) {
+        const Kept after = storedAfterRefusalOf(key);
+        ASSERT_EQ(after.size(), 2U) << key;
+        EXPECT_EQ(after.at(AttributeKey::Storage).asObject(), stored.at(AttributeKey::Storage).asObject()) << key;
+        EXPECT_EQ(after.at(AttributeKey::StorageChecksum).asInteger(),
+                  stored.at(AttributeKey::StorageChecksum).asInteger())
+            << key;
+    }
+}
+
+TEST_F(ProjectStorageTest, KeepsThePreviewedEventsWhereTheMemosCannotBeRead)
+{
+    const auto memos = host.addTrack(TypeWord::Marker, u"Memos");
+    host.handle(memos).setRole(TrackRole::Memos);
+    host.addPointMarker(memos, u"memo", 86400.0 + 3601.0);
+    host.adapter.model().setPreviewActive(true);
+    host.adapter.previewEvents().add(host.adapter.model().changeEdl().eventAt(0));
+    host.adapter.save();
+    AlteredDocument document(host.document());
+    document.hasContainers = false;
+
+    Project opened(host.context(), &document);
+    opened.load();
+
+    EXPECT_EQ(opened.previewEvents().size(), 1U);
+    EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
 }
 
 TEST_F(ProjectStorageTest, ReadsTheTimecodesUnderTheRateOfItsOwnProject)

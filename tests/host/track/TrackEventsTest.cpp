@@ -422,21 +422,6 @@ TEST_P(TrackEventsTest, APointAtTheEndOfARangeIsNotRemovedWithIt)
     EXPECT_EQ(standin::tests::namesOf(*memoNode), (Names{u"before", u"end"}));
 }
 
-TEST_P(TrackEventsTest, RemovesTheEventsThatStartInARangeWhereverTheyEnd)
-{
-    host.addRangeMarker(memoNode, u"over start", 9.0, 15.0);
-    host.addRangeMarker(memoNode, u"whole", 10.1, 20.3);
-    host.addPointMarker(memoNode, u"inside", 15.0);
-    host.addRangeMarker(memoNode, u"over end", 20.0, 25.0);
-    host.addRangeMarker(memoNode, u"behind", 20.3, 25.0);
-
-    host.edit(u"Remove", [&] { memos.removeStartingIn(*host.transaction(), clock(10.1), clock(20.3)); });
-
-    EXPECT_EQ(standin::tests::namesOf(*memoNode), (Names{u"over start", u"behind"}));
-    EXPECT_EQ(resultOf([&] { memos.removeStartingIn(*host.transaction(), clock(2.0), clock(1.0)); }),
-              Result::InvalidArgument);
-}
-
 TEST_P(TrackEventsTest, RemovesNothingInARangeWithoutLength)
 {
     host.addPointMarker(memoNode, u"point", 10.0);

@@ -178,7 +178,7 @@ TEST_F(VideoTrackHandlerTest, GivesTheOtherTrackTheOtherPicture)
 
     handler.setMode(0, Mode::Old);
     EXPECT_EQ(roleOf(first), 10);
-    EXPECT_EQ(roleOf(second), 8);
+    EXPECT_EQ(roleOf(second), 8) << "The two have changed places.";
 
     handler.setMode(1, Mode::Old);
     EXPECT_EQ(roleOf(first), 8);
@@ -188,6 +188,31 @@ TEST_F(VideoTrackHandlerTest, GivesTheOtherTrackTheOtherPicture)
     EXPECT_EQ(roleOf(first), 10);
     EXPECT_EQ(roleOf(second), 8);
     EXPECT_EQ(listener.calls, 4);
+}
+
+TEST_F(VideoTrackHandlerTest, TheNewPictureIsOnNoTrackThatNobodyHasNamedForIt)
+{
+    // A run replaces all that stands on the track of the new picture.
+    const auto first = host.addVideoTrack(u"first");
+    const auto second = host.addVideoTrack(u"second");
+    rebuild();
+
+    handler.setMode(0, Mode::Old);
+    EXPECT_EQ(modes(), (Modes{0, -1}));
+    handler.setMode(1, Mode::Old);
+    EXPECT_EQ(modes(), (Modes{-1, 0})) << "There is one old picture.";
+    EXPECT_EQ(roleOf(first), -1);
+
+    for (const std::int32_t other : {0, 7, 256, 8, 264}) {
+        host.handle(first).setRole(other);
+        host.handle(second).setRole(-1);
+        handler.setMode(1, Mode::Old);
+        EXPECT_EQ(roleOf(first), other);
+    }
+    host.handle(first).setRole(266);
+    host.handle(second).setRole(264);
+    handler.setMode(1, Mode::Old);
+    EXPECT_EQ(roleOf(first), 264) << "The video on it stays the user's.";
 }
 
 TEST_F(VideoTrackHandlerTest, TurnsATrackOffByItself)

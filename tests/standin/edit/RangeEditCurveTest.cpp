@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "standin/file/ProjectFile.h"
 #include "tests/standin/edit/RangeEditHost.h"
-
+#include "tests/support/TempFolder.h"
 #include "velmark/Automation.h"
 #include "velmark/Events.h"
 
@@ -188,12 +189,12 @@ TEST(AutomationInRanges, ACopyOntoItselfChangesNothing)
 {
     Film film;
     film.addVolume(film.track, {{10, 0.0f}, {10, 0.5f}, {20, 0.75f}, {20, 0.0f}, {30, 1.0f}});
-    const std::string before = film.dump();
+    const std::string before = film.volumeOf(film.track);
 
     film.copyRange({film.track}, 10, 20, 10);
     film.copyRange({film.track}, 13, 26, 13);
 
-    EXPECT_EQ(film.dump(), before);
+    EXPECT_EQ(film.volumeOf(film.track), before);
 }
 
 TEST(AutomationInRanges, TheEdgesBetweenNeighbouringCopiesCloseAgainInWhateverOrderTheyAreMade)
@@ -432,6 +433,62 @@ TEST(AutomationInRanges, DeletingACopyLeavesTheBytesOfBefore)
     film.deleteRange(40, 48);
 
     EXPECT_EQ(film.dump(), before);
+}
+
+TEST(AutomationInRanges, APointThatHoldsACurveGoesAlsoAfterTheProjectWasOpenedAnew)
+{
+    const cadrel::tests::TempFolder folder;
+    Film film;
+    film.addVolume(film.track, {{0, 0.0f}, {16, 1.0f}, {20, 0.25f}, {60, 0.25f}});
+    const std::string before = film.dump();
+    film.copyRange({film.track}, 4, 12, 40);
+    film.application.saveProject(film.project, folder / "film.stage");
+
+    Project& reopened = film.application.openProject(folder / "film.stage");
+    EXPECT_EQ(film.transaction()->begin(true), ResultOk);
+    EXPECT_EQ(film.transaction()->deleteRange(&reopened, 0, 40, 48), ResultOk);
+    EXPECT_EQ(film.transaction()->commit(&reopened, u"Delete"), ResultOk);
+
+    EXPECT_EQ(ProjectFile::toText(reopened), before);
+}
+
+TEST(AutomationInRanges, WritingTheValueOfACurveOverTheFirstOfItsPointsLeavesThePoint)
+{
+    for (const double second : {30.0, 50.0, 605.0, 605.1, 86405.0}) {
+        Film film;
+        film.addVolume(film.track, {{5, 0.25f}, {second, 0.25f}});
+        const std::string before = film.dump();
+
+        film.copyRange({film.track}, 100000, 100010, 0);
+
+        EXPECT_EQ(film.dump(), before) << second;
+    }
+}
+
+TEST(AutomationInRanges, APointThatOnlyHoldsACurveMayBeTheOneThatIsLeftBeforeACopy)
+{
+    Film film;
+    const auto held = film.addPoint(film.track, Envelope::Curve::Volume, 5, 0.25f);
+    dynamic_cast<AutomationPoint&>(*held).setHolding(true);
+    film.addVolume(film.track, {{20, 0.25f}});
+
+    film.copyRange({film.track}, 100, 110, 15);
+
+    EXPECT_EQ(film.volumeOf(film.track), "5=0.25");
+}
+
+TEST(AutomationInRanges, DeletingACopyOfTheOnlyPointLeavesTheBytesOfBeforeWhereverItWas)
+{
+    for (const double destination : {0.0, 30.0, 1000.0, 86400.0}) {
+        Film film;
+        film.addVolume(film.track, {{50 + destination, 0.25f}});
+        const std::string before = film.dump();
+
+        film.copyRange({film.track}, 45 + destination, 55 + destination, destination);
+        film.deleteRange(destination, destination + 10);
+
+        EXPECT_EQ(film.dump(), before) << destination;
+    }
 }
 
 } // namespace standin::tests

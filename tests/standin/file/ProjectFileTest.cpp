@@ -339,6 +339,19 @@ TEST_F(ProjectFileForm, GivesCurvesBackWithTheirPointsInOrder)
     EXPECT_EQ(curve.pointBehind(*third), nullptr);
 }
 
+TEST_F(ProjectFileForm, SaysOfAPointWhetherItOnlyHoldsACurve)
+{
+    const auto project = parse(projectWithTrack("audio", R"("curves": [{"number": 5, "automates": "filter", "points": [
+        {"time": 1, "value": 0, "holding": true}, {"time": 2, "value": 1}]}])"));
+    const Envelope& curve = *trackOf(*project).curves().at(Envelope::Curve::Filter);
+
+    EXPECT_TRUE(curve.firstPoint()->isHolding());
+    EXPECT_FALSE(curve.pointBehind(*curve.firstPoint())->isHolding());
+    const std::string text = ProjectFile::toText(*project);
+    EXPECT_NE(text.find(R"({"time": 1, "value": 0, "holding": true})"), std::string::npos) << text;
+    EXPECT_NE(text.find(R"({"time": 2, "value": 1})"), std::string::npos) << text;
+}
+
 TEST_F(ProjectFileForm, GivesAttributesOfEveryKindBack)
 {
     const auto project = parse(projectWith(

@@ -49,7 +49,7 @@ struct CutFilm : ConformFilm {
 
     core::CadrelRunState runState() const
     {
-        return {&model.oldEdl(), &model.newEdl(), project.framerate, &model.settings(), 0.0};
+        return {&model.oldEdl(), &model.newEdl(), project.framerate, &model.settings(), previewOffset, 0.0};
     }
     core::CadrelPreviewState previewState() const { return {project.framerate, &model.settings()}; }
 
@@ -60,6 +60,7 @@ struct CutFilm : ConformFilm {
     }
 
     core::CutList cuts;
+    double previewOffset = 0.0; ///< seconds
 };
 
 inline std::shared_ptr<core::CutEventBase> cutEvent(MemoryTrack& track, core::SecondsRange source,

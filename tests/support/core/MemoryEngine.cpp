@@ -302,7 +302,7 @@ Result::Type MemoryEngine::generateMarkers(const std::vector<MarkerEntry>& entri
 
 core::CadrelRunState MemoryEngine::getRunState()
 {
-    return {&m_model.oldEdl(), &m_model.newEdl(), Timecode::framerate(), &m_model.settings(), stretchStart()};
+    return {&m_model.oldEdl(), &m_model.newEdl(), Timecode::framerate(), &m_model.settings(), stretchStart(), 0.0};
 }
 
 core::CadrelPreviewState MemoryEngine::getPreviewState()

@@ -5,7 +5,7 @@
 #include <map>
 #include <optional>
 
-namespace cadrel::app {
+namespace cadrel::core {
 
 /// How much later each stretch is in the new programme than in the old one, in seconds. Where stretches overlap, the
 /// one that was added last counts, as in a run:
@@ -29,4 +29,4 @@ private:
     std::map<double, Stretch> m_stretches; ///< by their starts; they don't overlap
 };
 
-} // namespace cadrel::app
+} // namespace cadrel::core

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/apply/ProgrammeShift.h"
+#include "core/cut/ProgrammeShift.h"
 
 #include <iterator>
 
-namespace cadrel::app {
+namespace cadrel::core {
 
 void ProgrammeShift::add(double start, double end, double shift)
 {
@@ -35,4 +35,4 @@ std::optional<double> ProgrammeShift::at(double time) const
     return time < stretch.end ? std::optional(stretch.shift) : std::nullopt;
 }
 
-} // namespace cadrel::app
+} // namespace cadrel::core

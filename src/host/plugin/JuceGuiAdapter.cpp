@@ -1,0 +1,260 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/plugin/JuceGuiAdapter.h"
+
+#include "host/border/HostFailure.h"
+#include "host/plugin/HostKeys.h"
+#include "host/plugin/XConnection.h"
+#include "velmark/Context.h"
+#include "velmark/UserInterface.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstdint>
+#include <cstring>
+#include <utility>
+
+namespace cadrel::host {
+
+using namespace Velmark;
+
+namespace {
+
+constexpr ViewRect MinimumRect{0, 0, JuceGuiAdapter::MinimumWidth, JuceGuiAdapter::MinimumHeight};
+
+int32 widthOf(const ViewRect& rect)
+{
+    return rect.right - rect.left;
+}
+
+int32 heightOf(const ViewRect& rect)
+{
+    return rect.bottom - rect.top;
+}
+
+XConnection::Window windowOf(const void* handle)
+{
+    return static_cast<XConnection::Window>(reinterpret_cast<std::uintptr_t>(handle));
+}
+
+/// Whether a key is one of the host's: its letter with Control and with or without Shift.
+bool isEditKey(const juce::KeyPress& key, char letter, bool withShift)
+{
+    const juce::ModifierKeys modifiers = key.getModifiers();
+    return juce::CharacterFunctions::toLowerCase(static_cast<juce::juce_wchar>(key.getKeyCode())) ==
+               static_cast<juce::juce_wchar>(letter) &&
+           modifiers.isCtrlDown() && !modifiers.isAltDown() && modifiers.isShiftDown() == withShift;
+}
+
+} // namespace
+
+JuceGuiAdapter::JuceGuiAdapter(std::unique_ptr<juce::Component> content, IHostContext* context, Counted<FObject> engine)
+    : Implements(MinimumRect), m_content(std::move(content)), m_context(context), m_engine(std::move(engine))
+{
+    setOpaque(true);
+    setVisible(true);
+    setTopLeftPosition(0, 0);
+    setSize(MinimumWidth, MinimumHeight);
+    addAndMakeVisible(*m_content, -1);
+    layOutContent();
+}
+
+JuceGuiAdapter::~JuceGuiAdapter()
+{
+    dispose();
+}
+
+void JuceGuiAdapter::dispose()
+{
+    const juce::MessageManagerLock lock;
+    if (m_content)
+        removeChildComponent(m_content.get());
+    m_content.reset();
+    removeFromDesktop();
+    m_engine.reset();
+}
+
+int32 JuceGuiAdapter::isPlatformTypeSupported(const char* type)
+{
+    return type && std::strcmp(type, ParentType::X11Window) == 0 ? ResultOk : ResultFalse;
+}
+
+int32 JuceGuiAdapter::attached(void* parent, const char* type)
+{
+    if (!parent || !m_content || systemWindow() || isPlatformTypeSupported(type) != ResultOk)
+        return ResultFalse;
+    if (resultOf([&] { attachTo(parent); }) == util::Result::Ok)
+        return CPluginView::attached(parent, type);
+    removeFromDesktop();
+    return ResultFalse;
+}
+
+void JuceGuiAdapter::attachTo(void* parent)
+{
+    setVisible(true);
+    removeFromDesktop();
+    addToDesktop(0, parent);
+    if (!getPeer())
+        throw util::Result::HostObjectMissing;
+    setVisible(true);
+    // Until its parent first moves, JUCE takes the window to be at the corner of the screen, and opens menus there.
+    if (const XConnection connection; connection.isOpen())
+        connection.tellPlace(windowOf(getPeer()->getNativeHandle()));
+    const ViewRect wanted = rectOf(getLocalBounds());
+    if (plugFrame() && (widthOf(wanted) != widthOf(rect()) || heightOf(wanted) != heightOf(rect())))
+        plugFrame()->resizeView(this, wanted);
+}
+
+int32 JuceGuiAdapter::removed()
+{
+    if (!systemWindow())
+        return ResultOk;
+    const juce::MessageManagerLock lock;
+    if (isOnDesktop())
+        removeFromDesktop();
+    return CPluginView::removed();
+}
+
+int32 JuceGuiAdapter::idle()
+{
+    return resultOf([] { serve(); });
+}
+
+int32 JuceGuiAdapter::onWheel(float distance)
+{
+    juce::ComponentPeer* const peer = getPeer();
+    if (!peer)
+        return ResultFalse;
+    resultOf([&] {
+        juce::MouseWheelDetails wheel = {};
+        wheel.deltaY = distance;
+        const auto place = peer->globalToLocal(juce::Desktop::getMousePosition().toFloat());
+        peer->handleMouseWheel(juce::MouseInputSource::InputSourceType::mouse, place, juce::Time::currentTimeMillis(),
+                               wheel);
+    });
+    return ResultFalse;
+}
+
+int32 JuceGuiAdapter::onKeyDown(char16_t key, int32 virtualKey, int32 modifiers)
+{
+    bool isUsed = false;
+    resultOf([&] {
+        const juce::ScopedValueSetter<bool> fromHost(m_keyIsFromHost, true);
+        const auto press = toKeyPress(key, virtualKey, modifiers);
+        if (juce::ComponentPeer* const peer = getPeer(); peer && press)
+            isUsed = peer->handleKeyPress(*press);
+    });
+    return isUsed ? ResultFalse : ResultOk;
+}
+
+int32 JuceGuiAdapter::onKeyUp(char16_t /*key*/, int32 /*virtualKey*/, int32 /*modifiers*/)
+{
+    bool isUsed = false;
+    resultOf([&] {
+        if (juce::ComponentPeer* const peer = getPeer())
+            isUsed = peer->handleKeyUpOrDown(false);
+    });
+    return isUsed ? ResultFalse : ResultOk;
+}
+
+int32 JuceGuiAdapter::onSize(const ViewRect& rect)
+{
+    CPluginView::onSize(rect);
+    return resultOf([&] {
+        const auto toOurs = [](int32 pixels) { return static_cast<int>(std::lround(pixels / scale())); };
+        setSize(toOurs(widthOf(rect)), toOurs(heightOf(rect)));
+    });
+}
+
+int32 JuceGuiAdapter::onFocus(bool state)
+{
+    return resultOf([&] {
+        // A host may say so again while a field of the content has it.
+        if (state && m_content && isShowing() && !hasKeyboardFocus(true))
+            m_content->grabKeyboardFocus();
+    });
+}
+
+int32 JuceGuiAdapter::checkSizeConstraint(ViewRect& rect)
+{
+    return resultOf([&] {
+        const ViewRect least = rectOf({MinimumWidth, MinimumHeight});
+        int32 width = widthOf(least);
+        int32 height = heightOf(least);
+        if (const auto* const display = juce::Desktop::getInstance().getDisplays().getPrimaryDisplay()) {
+            const ViewRect screen = rectOf(display->userArea);
+            width = std::min(width, widthOf(screen));
+            height = std::min(height, heightOf(screen));
+        }
+        rect.right = std::max(rect.right, rect.left + width);
+        rect.bottom = std::max(rect.bottom, rect.top + height);
+    });
+}
+
+double JuceGuiAdapter::scale()
+{
+    return juce::Desktop::getInstance().getGlobalScaleFactor();
+}
+
+ViewRect JuceGuiAdapter::rectOf(juce::Rectangle<int> size) const
+{
+    const auto toHosts = [](int pixels) { return static_cast<int32>(std::lround(pixels * scale())); };
+    return {rect().left, rect().top, rect().left + toHosts(size.getWidth()), rect().top + toHosts(size.getHeight())};
+}
+
+void JuceGuiAdapter::resized()
+{
+    layOutContent();
+}
+
+void JuceGuiAdapter::layOutContent()
+{
+    // A window of ours has at least one pixel, also where the host has left none.
+    if (!m_content || widthOf(rect()) <= 0 || heightOf(rect()) <= 0)
+        return;
+    const juce::ScopedValueSetter<bool> layingOut(m_isLayingOut, true);
+    const double widthShare = static_cast<double>(getWidth()) / MinimumWidth;
+    const double heightShare = static_cast<double>(getHeight()) / MinimumHeight;
+    const double factor = std::min({widthShare, heightShare, 1.0});
+    m_content->setTransform(juce::AffineTransform::scale(static_cast<float>(factor)));
+    m_content->setBounds(0, 0, static_cast<int>(std::lround(getWidth() / factor)),
+                         static_cast<int>(std::lround(getHeight() / factor)));
+}
+
+void JuceGuiAdapter::childBoundsChanged(juce::Component* child)
+{
+    if (m_isLayingOut || !m_content || child != m_content.get() || !plugFrame())
+        return;
+    const ViewRect wanted = rectOf(getLocalArea(m_content.get(), m_content->getLocalBounds()));
+    if (widthOf(wanted) == widthOf(rect()) && heightOf(wanted) == heightOf(rect()))
+        return;
+    if (plugFrame()->resizeView(this, wanted) != ResultOk)
+        layOutContent();
+}
+
+bool JuceGuiAdapter::keyPressed(const juce::KeyPress& key)
+{
+    if (isEditKey(key, 'z', false))
+        return invokeEditAction(IActionManager::Undo);
+    if (isEditKey(key, 'z', true))
+        return invokeEditAction(IActionManager::Redo);
+    if (!m_keyIsFromHost)
+        sendToParent(key);
+    return false;
+}
+
+bool JuceGuiAdapter::invokeEditAction(const char* action)
+{
+    const auto actions = service<IActionManager>(m_context);
+    return actions && actions->invoke(IActionManager::EditCategory, action, 0) == ResultOk;
+}
+
+void JuceGuiAdapter::sendToParent(const juce::KeyPress& key)
+{
+    if (!systemWindow())
+        return;
+    if (const XConnection connection; connection.isOpen())
+        connection.sendKey(windowOf(systemWindow()), toXKey(key));
+}
+
+} // namespace cadrel::host

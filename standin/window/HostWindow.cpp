@@ -1,0 +1,117 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "standin/window/HostWindow.h"
+
+#include "velmark/Module.h"
+
+#include <utility>
+
+namespace standin {
+
+using namespace Velmark;
+
+namespace {
+
+int32 widthOf(const ViewRect& rect)
+{
+    return rect.right - rect.left;
+}
+
+int32 heightOf(const ViewRect& rect)
+{
+    return rect.bottom - rect.top;
+}
+
+} // namespace
+
+HostWindow::HostWindow(WindowSystem& windows, WindowDescription description, Counted<IPlugView> view, Changed changed)
+    : m_windows(windows), m_description(std::move(description)), m_view(std::move(view)), m_changed(std::move(changed))
+{
+}
+
+HostWindow::~HostWindow() = default;
+
+int32 HostWindow::open()
+{
+    if (m_native || !m_view || m_view->isPlatformTypeSupported(m_windows.parentType()) != ResultOk)
+        return ResultFalse;
+    ViewRect rect;
+    m_view->getSize(rect);
+    m_native = m_windows.createWindow(m_description.title, widthOf(rect), heightOf(rect), *this);
+    if (!m_native)
+        return ResultFalse;
+    m_view->setFrame(this);
+    if (m_view->attached(m_native->parent(), m_windows.parentType()) != ResultOk) {
+        m_view->setFrame(nullptr);
+        m_native.reset();
+        return ResultFalse;
+    }
+    m_native->show();
+    m_changed(*this, true);
+    return ResultOk;
+}
+
+int32 HostWindow::setCloseNotification(ICloseWindowNotification* listener)
+{
+    m_listener = listener;
+    return ResultOk;
+}
+
+int32 HostWindow::show(bool visible)
+{
+    if (!m_native)
+        return ResultFalse;
+    if (visible)
+        m_native->show();
+    else
+        close();
+    return ResultOk;
+}
+
+void HostWindow::close()
+{
+    if (!m_native)
+        return;
+    // Whoever is told may give back the last reference.
+    const auto self = Counted<HostWindow>::share(this);
+    m_view->removed();
+    m_view->setFrame(nullptr);
+    m_view.reset();
+    m_native.reset();
+    if (ICloseWindowNotification* const listener = std::exchange(m_listener, nullptr))
+        listener->windowClosed(this);
+    m_changed(*this, false);
+}
+
+int32 HostWindow::resizeView(IPlugView* view, const ViewRect& rect)
+{
+    if (!m_native || view != m_view.get() || !m_description.isResizable || widthOf(rect) <= 0 || heightOf(rect) <= 0)
+        return ResultFalse;
+    m_native->setSize(widthOf(rect), heightOf(rect));
+    return m_view->onSize({0, 0, widthOf(rect), heightOf(rect)});
+}
+
+void HostWindow::resizedByUser(int32 width, int32 height)
+{
+    ViewRect rect{0, 0, width, height};
+    if (m_view->canResize() == 0)
+        m_view->getSize(rect);
+    else
+        m_view->checkSizeConstraint(rect);
+    if (widthOf(rect) != width || heightOf(rect) != height)
+        m_native->setSize(widthOf(rect), heightOf(rect));
+    m_view->onSize({0, 0, widthOf(rect), heightOf(rect)});
+}
+
+void HostWindow::focusChanged(bool hasFocus)
+{
+    m_view->onFocus(hasFocus);
+}
+
+void HostWindow::idle()
+{
+    if (m_view && m_native)
+        Counted<IPlugView>(m_view)->idle();
+}
+
+} // namespace standin

@@ -1,0 +1,309 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/plugin/Cadrel.h"
+
+#include "standin/Application.h"
+#include "standin/edit/ActionManager.h"
+#include "standin/module/ModuleLoader.h"
+#include "standin/services/MenuRegistry.h"
+#include "standin/services/Translations.h"
+#include "standin/services/WindowFactoryRegistry.h"
+#include "standin/window/HostWindow.h"
+#include "standin/window/ViewManager.h"
+#include "velmark/Context.h"
+#include "velmark/ModuleState.h"
+#include "velmark/Project.h"
+
+#include "tests/support/TreePaths.h"
+#include "tests/support/x11/VirtualScreen.h"
+#include "tests/support/x11/XWindows.h"
+
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <filesystem>
+#include <fstream>
+#include <string>
+#include <thread>
+#include <utility>
+#include <vector>
+
+using namespace Velmark;
+using cadrel::host::Cadrel;
+
+namespace {
+
+/// The stand-in's context with some of its services replaced; null takes one away.
+class OtherContext : public Implements<OtherContext, FObject, IHostContext> {
+public:
+    static constexpr const char* ClassName = "OtherContext";
+
+    explicit OtherContext(IHostContext* context) : m_context(context) {}
+
+    template <class Interface>
+    void replace(Interface* service)
+    {
+        m_replaced.push_back({Interface::iid, service});
+    }
+
+    int32 queryInterface(const Identifier& id, void** out) override
+    {
+        if (id == IHostContext::iid || id == FUnknown::iid)
+            return Implements::queryInterface(id, out);
+        return getInterface(id, out);
+    }
+    int32 getInterface(const Identifier& id, void** out) override
+    {
+        for (const auto& [replacedId, service] : m_replaced) {
+            if (replacedId != id)
+                continue;
+            *out = nullptr;
+            return service ? service->queryInterface(id, out) : ResultNoInterface;
+        }
+        return m_context->getInterface(id, out);
+    }
+
+private:
+    IHostContext* m_context;
+    std::vector<std::pair<Identifier, FUnknown*>> m_replaced;
+};
+
+class OtherHostInfo : public Implements<OtherHostInfo, FObject, IHostInfo> {
+public:
+    static constexpr const char* ClassName = "OtherHostInfo";
+
+    const char* getName() override { return name; }
+
+    const char* name = "Studio";
+};
+
+class RefusingFactories : public Implements<RefusingFactories, FObject, IWindowFactoryRegistry> {
+public:
+    static constexpr const char* ClassName = "RefusingFactories";
+
+    int32 addFactory(IPlugWindowFactory*) override { return ResultFalse; }
+    int32 removeFactory(IPlugWindowFactory*) override
+    {
+        ++removals;
+        return ResultFalse;
+    }
+
+    int removals = 0;
+};
+
+/// Opens windows that can't come on the screen.
+class BrokenViews : public Implements<BrokenViews, FObject, IViewManager> {
+public:
+    static constexpr const char* ClassName = "BrokenViews";
+
+    class Window : public Implements<Window, FObject, IHostWindow> {
+    public:
+        static constexpr const char* ClassName = "Window";
+
+        int32 open() override { return 7; }
+        int32 setCloseNotification(ICloseWindowNotification* given) override
+        {
+            listener = given;
+            return ResultOk;
+        }
+        int32 show(bool) override { return ResultOk; }
+
+        ICloseWindowNotification* listener = nullptr;
+        Counted<IPlugView> view;
+    };
+
+    int32 loadSkin(BundleHandle, const char*) override { return ResultOk; }
+    int32 openWindow(const char* name, IViewBuilder* builder, IHostWindow** out) override
+    {
+        window = makeCounted<Window>();
+        builder->createView(name, nullptr, window->view.out());
+        *out = Counted<Window>(window).detach();
+        return ResultOk;
+    }
+
+    Counted<Window> window;
+};
+
+class CadrelTest : public testing::Test {
+protected:
+    CadrelTest()
+    {
+        m_application.views().setWindowSystem(&m_windows);
+        ModuleState::get().enter(m_bundle.data());
+    }
+    ~CadrelTest() override
+    {
+        m_cadrel.reset();
+        m_application.views().setWindowSystem(nullptr);
+        ModuleState::get().exit();
+    }
+
+    /// In the context with what is replaced.
+    int32 initialize() { return m_cadrel->initialize(static_cast<IHostContext*>(m_context.get())); }
+    bool isRegistered()
+    {
+        return !m_application.menus().commands().empty() || !m_application.windowFactories().factories().empty() ||
+               m_application.actions().invoke("Cadrel", "ShowDialog", 0) == ResultOk;
+    }
+
+    std::string m_bundle = cadrel::tests::treePath("resources");
+    cadrel::tests::VirtualScreen m_screen;
+    cadrel::tests::XWindows m_windows;
+    standin::Application m_application;
+    Counted<OtherContext> m_context = makeCounted<OtherContext>(m_application.context());
+    Counted<Cadrel> m_cadrel = makeCounted<Cadrel>();
+};
+
+} // namespace
+
+TEST_F(CadrelTest, AnswersForAllThatAHostAsksAndKeepsTheRestToItself)
+{
+    EXPECT_TRUE(query<IPluginBase>(m_cadrel));
+    EXPECT_TRUE(query<IActionHandler>(m_cadrel));
+    EXPECT_TRUE(query<IViewBuilder>(m_cadrel));
+    EXPECT_TRUE(query<IPlugController>(m_cadrel));
+    EXPECT_TRUE(query<IPlugWindowFactory>(m_cadrel));
+    EXPECT_FALSE(query<IIdleHandler>(m_cadrel));
+    EXPECT_TRUE(m_cadrel->isA("Cadrel", false));
+    EXPECT_FALSE(m_cadrel->isA("FObject", false));
+    EXPECT_TRUE(m_cadrel->isA("FObject", true));
+}
+
+TEST_F(CadrelTest, WorksInNoOtherHost)
+{
+    EXPECT_EQ(m_cadrel->initialize(nullptr), 1);
+    const auto info = makeCounted<OtherHostInfo>();
+    m_context->replace<IHostInfo>(info.get());
+    for (const char* const name : {"Studio", "stagio", "Stagio 2", "", static_cast<const char*>(nullptr)}) {
+        info->name = name;
+        EXPECT_EQ(initialize(), 1);
+    }
+    EXPECT_FALSE(isRegistered());
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+
+    info->name = "Stagio";
+    EXPECT_EQ(initialize(), ResultOk);
+}
+
+TEST_F(CadrelTest, WorksInNoHostWithoutAName)
+{
+    m_context->replace<IHostInfo>(nullptr);
+
+    EXPECT_EQ(initialize(), 1);
+    EXPECT_FALSE(isRegistered());
+}
+
+TEST_F(CadrelTest, TakesEverythingBackWhenAStepFails)
+{
+    const auto factories = makeCounted<RefusingFactories>();
+    m_context->replace<IWindowFactoryRegistry>(factories.get());
+
+    EXPECT_NE(initialize(), ResultOk);
+    EXPECT_FALSE(isRegistered());
+    EXPECT_EQ(factories->removals, 0);
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+
+    EXPECT_EQ(m_cadrel->initialize(m_application.context()), ResultOk);
+    EXPECT_TRUE(isRegistered());
+}
+
+TEST_F(CadrelTest, NeedsTheProjectsOfTheHost)
+{
+    m_context->replace<IProjectManager>(nullptr);
+
+    EXPECT_NE(initialize(), ResultOk);
+    EXPECT_FALSE(isRegistered());
+}
+
+TEST_F(CadrelTest, DoesWithoutMenusActionsWindowsAndTranslations)
+{
+    m_context->replace<IMenuRegistry>(nullptr);
+    m_context->replace<IActionManager>(nullptr);
+    m_context->replace<IWindowFactoryRegistry>(nullptr);
+    m_context->replace<ITranslationService>(nullptr);
+    m_context->replace<IViewManager>(nullptr);
+
+    EXPECT_EQ(initialize(), ResultOk);
+    EXPECT_FALSE(isRegistered());
+    EXPECT_NE(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+}
+
+TEST_F(CadrelTest, IsInitialisedOnceAtATime)
+{
+    EXPECT_EQ(m_cadrel->initialize(m_application.context()), ResultOk);
+    EXPECT_NE(m_cadrel->initialize(m_application.context()), ResultOk);
+
+    EXPECT_EQ(m_application.menus().commands().size(), 1U);
+    EXPECT_EQ(m_application.windowFactories().factories().size(), 1U);
+}
+
+TEST_F(CadrelTest, TakesItsRegistrationsBackAtItsEnd)
+{
+    m_cadrel->initialize(m_application.context());
+    ASSERT_TRUE(isRegistered());
+    m_cadrel.reset();
+
+    EXPECT_FALSE(isRegistered());
+}
+
+TEST_F(CadrelTest, OpensAWindowWithTheProjectThatIsActive)
+{
+    m_application.activateProject(&m_application.createProject());
+    m_cadrel->initialize(m_application.context());
+
+    EXPECT_EQ(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
+    ASSERT_EQ(m_application.views().windows().size(), 1U);
+    EXPECT_EQ(m_cadrel->getWindow(), m_application.views().windows().front().get());
+}
+
+TEST_F(CadrelTest, ForgetsAWindowThatDoesNotOpen)
+{
+    const auto views = makeCounted<BrokenViews>();
+    m_context->replace<IViewManager>(views.get());
+    initialize();
+
+    EXPECT_EQ(m_cadrel->handleAction("Cadrel", "ShowDialog", true), 7);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
+    EXPECT_EQ(views->window->listener, nullptr);
+    EXPECT_FALSE(m_cadrel->hasWindow(views->window.get()));
+    EXPECT_EQ(m_cadrel->windowClosed(views->window.get()), ResultOk);
+}
+
+TEST_F(CadrelTest, TitlesItsCommandInTheLanguageThatTheHostKnowsBefore)
+{
+    m_application.translations().setLanguage("de");
+    m_cadrel->initialize(m_application.context());
+
+    EXPECT_EQ(m_application.menus().commands().front().title, u"Cadrel");
+    EXPECT_EQ(m_application.translations().translate(u"Preview"), std::u16string(u"Vorschau"));
+}
+
+TEST_F(CadrelTest, IsUnmappedAsAModuleOfAHostWithAJuceOfItsOwn)
+{
+    const cadrel::host::JuceLayer ofTheHost;
+    const auto module = std::filesystem::path(cadrel::tests::programPath("../lib/Cadrel.so")).lexically_normal();
+    const auto isMapped = [] {
+        std::ifstream maps("/proc/self/maps");
+        for (std::string line; std::getline(maps, line);) {
+            if (line.ends_with("/Cadrel.so"))
+                return true;
+        }
+        return false;
+    };
+    for (int round = 0; round < 10; ++round) {
+        {
+            const standin::ModuleLoader loader(m_application, module, m_bundle);
+            ASSERT_TRUE(isMapped());
+            ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
+            for (int count = 0; count < 10; ++count) {
+                m_windows.serve();
+                m_application.idle();
+                cadrel::host::JuceLayer::serve();
+                std::this_thread::sleep_for(std::chrono::milliseconds(5));
+            }
+        }
+        ASSERT_FALSE(isMapped()) << round;
+    }
+}

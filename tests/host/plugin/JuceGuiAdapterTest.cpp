@@ -1,0 +1,460 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/plugin/JuceGuiAdapter.h"
+
+#include "standin/Application.h"
+#include "standin/edit/ActionManager.h"
+#include "standin/window/HostWindow.h"
+#include "velmark/Context.h"
+
+#include "tests/support/x11/VirtualScreen.h"
+#include "tests/support/x11/XUser.h"
+#include "tests/support/x11/XWindows.h"
+
+#include <gtest/gtest.h>
+
+#include <X11/keysym.h>
+
+#include <algorithm>
+#include <chrono>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <thread>
+#include <vector>
+
+using namespace Velmark;
+using cadrel::host::JuceGuiAdapter;
+using cadrel::host::JuceLayer;
+using cadrel::tests::VirtualScreen;
+using cadrel::tests::XUser;
+using cadrel::tests::XWindows;
+
+namespace {
+
+/// Notes what comes to it, and holds a text field at the top.
+class Content : public juce::Component {
+public:
+    explicit Content(std::vector<std::string>& calls) : m_calls(calls)
+    {
+        setOpaque(true);
+        setWantsKeyboardFocus(true);
+        addAndMakeVisible(field);
+    }
+    ~Content() override { m_calls.push_back("gone"); }
+
+    void paint(juce::Graphics& graphics) override { graphics.fillAll(juce::Colour(0xff336699)); }
+    void resized() override { field.setBounds(10, 10, 200, 24); }
+    void mouseDown(const juce::MouseEvent& event) override
+    {
+        place = event.getPosition();
+        grabKeyboardFocus();
+        m_calls.push_back("mouse");
+        if (throws)
+            throw std::runtime_error("mouse");
+    }
+    void mouseWheelMove(const juce::MouseEvent&, const juce::MouseWheelDetails& wheel) override
+    {
+        m_calls.push_back(wheel.deltaY > 0 ? "wheel up" : "wheel down");
+    }
+    bool keyPressed(const juce::KeyPress& key) override
+    {
+        m_calls.push_back("key " + key.getTextDescription().toStdString());
+        return key.getKeyCode() == 'a';
+    }
+
+    juce::TextEditor field;
+    juce::Point<int> place;
+    bool throws = false;
+
+private:
+    std::vector<std::string>& m_calls;
+};
+
+/// The action handler that undo and redo would reach through the host.
+class Actions : public Implements<Actions, FObject, IActionManager, IHostContext> {
+public:
+    static constexpr const char* ClassName = "Actions";
+
+    int32 addHandler(IActionHandler*) override { return ResultFalse; }
+    int32 removeHandler(IActionHandler*) override { return ResultFalse; }
+    int32 invoke(const char* category, const char* action, int32) override
+    {
+        invoked.push_back(std::string(category) + "/" + action);
+        return ResultOk;
+    }
+    int32 getInterface(const Identifier& id, void** out) override { return queryInterface(id, out); }
+
+    std::vector<std::string> invoked;
+};
+
+class JuceGuiAdapterTest : public testing::Test {
+protected:
+    ~JuceGuiAdapterTest() override
+    {
+        if (m_window)
+            m_window->show(false);
+        m_window.reset();
+        m_view.reset();
+    }
+
+    void startServer(int width = 1600, int height = 1000, int dpi = 0)
+    {
+        m_screen = std::make_unique<VirtualScreen>(width, height);
+        if (dpi != 0)
+            m_screen->setDpi(dpi);
+        m_windows = std::make_unique<XWindows>();
+        m_user = std::make_unique<XUser>();
+        m_layer.emplace();
+    }
+    void makeView()
+    {
+        auto content = std::make_unique<Content>(m_calls);
+        m_content = content.get();
+        m_view = makeCounted<JuceGuiAdapter>(std::move(content), m_actions.get(), nullptr);
+    }
+    void open()
+    {
+        const auto ignore = [](standin::HostWindow&, bool) {};
+        m_window = makeCounted<standin::HostWindow>(*m_windows, standin::WindowDescription{"Window", "Test", true},
+                                                    Counted<IPlugView>(m_view), ignore);
+        ASSERT_EQ(m_window->open(), ResultOk);
+        ASSERT_TRUE(turnUntil([this] { return m_content->isShowing() && m_windows->colourAt(500, 400) == 0x336699; }));
+    }
+    void start()
+    {
+        startServer();
+        makeView();
+        open();
+    }
+
+    void turn()
+    {
+        m_windows->serve();
+        m_view->idle();
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    bool turnUntil(const std::function<bool()>& condition)
+    {
+        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+        while (!condition()) {
+            if (std::chrono::steady_clock::now() > end)
+                return false;
+            turn();
+        }
+        return true;
+    }
+    bool has(const std::string& call) const { return std::find(m_calls.begin(), m_calls.end(), call) != m_calls.end(); }
+    /// In the empty part of the content.
+    void clickContent()
+    {
+        m_user->moveTo(500, 400);
+        m_user->click();
+        ASSERT_TRUE(turnUntil([this] { return has("mouse") && m_content->hasKeyboardFocus(false); }));
+        m_calls.clear();
+    }
+    ViewRect size()
+    {
+        ViewRect rect;
+        m_view->getSize(rect);
+        return rect;
+    }
+
+    std::unique_ptr<VirtualScreen> m_screen;
+    std::unique_ptr<XWindows> m_windows;
+    std::unique_ptr<XUser> m_user;
+    std::optional<JuceLayer> m_layer; ///< the content is made before its view
+    Counted<Actions> m_actions = makeCounted<Actions>();
+    std::vector<std::string> m_calls;
+    Counted<JuceGuiAdapter> m_view;
+    Content* m_content = nullptr;
+    Counted<standin::HostWindow> m_window;
+};
+
+} // namespace
+
+TEST_F(JuceGuiAdapterTest, HasItsSizeBeforeItIsAttached)
+{
+    startServer();
+    makeView();
+
+    EXPECT_EQ(size().right, 1300);
+    EXPECT_EQ(size().bottom, 750);
+    EXPECT_EQ(m_content->getWidth(), 1300);
+    EXPECT_EQ(m_content->getHeight(), 750);
+}
+
+TEST_F(JuceGuiAdapterTest, IsAttachedToOneWindowOfTheXServerAlone)
+{
+    startServer();
+    makeView();
+    const auto native = [this] {
+        struct Listener : standin::NativeWindow::Listener {
+            void resizedByUser(std::int32_t, std::int32_t) override {}
+            void closedByUser() override {}
+            void focusChanged(bool) override {}
+        };
+        static Listener listener;
+        return m_windows->createWindow("Test", 1300, 750, listener);
+    }();
+
+    EXPECT_EQ(m_view->isPlatformTypeSupported("X11Window"), ResultOk);
+    EXPECT_NE(m_view->isPlatformTypeSupported("Other"), ResultOk);
+    EXPECT_NE(m_view->isPlatformTypeSupported(nullptr), ResultOk);
+    EXPECT_NE(m_view->attached(native->parent(), "Other"), ResultOk);
+    EXPECT_NE(m_view->attached(nullptr, "X11Window"), ResultOk);
+    EXPECT_EQ(m_view->removed(), ResultOk);
+
+    EXPECT_EQ(m_view->attached(native->parent(), "X11Window"), ResultOk);
+    EXPECT_NE(m_view->attached(native->parent(), "X11Window"), ResultOk);
+    EXPECT_TRUE(m_view->isOnDesktop());
+    EXPECT_EQ(m_view->removed(), ResultOk);
+    EXPECT_FALSE(m_view->isOnDesktop());
+    EXPECT_EQ(m_view->removed(), ResultOk);
+    EXPECT_EQ(m_view->attached(native->parent(), "X11Window"), ResultOk);
+}
+
+TEST_F(JuceGuiAdapterTest, BringsMouseAndWheelToTheContent)
+{
+    start();
+    m_user->moveTo(540, 430);
+    m_user->click();
+    EXPECT_TRUE(turnUntil([this] { return has("mouse"); }));
+    // The window of the host stands at 40, 30.
+    EXPECT_EQ(m_content->place, juce::Point<int>(500, 400));
+
+    m_user->wheelUp();
+    EXPECT_TRUE(turnUntil([this] { return has("wheel up"); }));
+
+    m_calls.clear();
+    EXPECT_EQ(m_view->onWheel(-1.0F), 1);
+    EXPECT_TRUE(has("wheel down"));
+}
+
+TEST_F(JuceGuiAdapterTest, KnowsItsPlaceOnTheScreenAtOnce)
+{
+    start();
+
+    EXPECT_TRUE(turnUntil([this] { return m_content->getScreenPosition() == juce::Point<int>(40, 30); }));
+}
+
+TEST_F(JuceGuiAdapterTest, LeavesTheKeysToTheHostThatItDoesNotUse)
+{
+    start();
+    clickContent();
+
+    m_user->press(XK_space);
+    EXPECT_TRUE(turnUntil([this] { return has("key spacebar") && !m_windows->keys().empty(); }));
+    EXPECT_EQ(m_windows->keys(), std::vector<unsigned long>{XK_space});
+
+    m_user->press('a');
+    EXPECT_TRUE(turnUntil([this] { return has("key A"); }));
+    m_user->press(XK_F5);
+    EXPECT_TRUE(turnUntil([this] { return m_windows->keys().size() > 1; }));
+    EXPECT_EQ(m_windows->keys(), (std::vector<unsigned long>{XK_space, XK_F5}));
+}
+
+TEST_F(JuceGuiAdapterTest, KeepsTheKeysThatATextFieldUses)
+{
+    start();
+    m_user->moveTo(100, 52);
+    m_user->click();
+    ASSERT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
+
+    m_user->press('b');
+    m_user->press(XK_space);
+    m_user->press('c');
+    EXPECT_TRUE(turnUntil([this] { return m_content->field.getText() == "b c"; })) << m_content->field.getText();
+    EXPECT_EQ(m_windows->keys(), std::vector<unsigned long>());
+    EXPECT_EQ(m_calls, std::vector<std::string>());
+}
+
+TEST_F(JuceGuiAdapterTest, TurnsUndoAndRedoIntoActionsOfTheHost)
+{
+    start();
+    clickContent();
+
+    m_user->press('z', XK_Control_L);
+    EXPECT_TRUE(turnUntil([this] { return !m_actions->invoked.empty(); }));
+    m_user->press('z', XK_Control_L, XK_Shift_L);
+    EXPECT_TRUE(turnUntil([this] { return m_actions->invoked.size() > 1; }));
+
+    EXPECT_EQ(m_actions->invoked, (std::vector<std::string>{"Edit/Undo", "Edit/Redo"}));
+    EXPECT_EQ(std::count(m_windows->keys().begin(), m_windows->keys().end(), static_cast<unsigned long>('z')), 0);
+}
+
+TEST_F(JuceGuiAdapterTest, AnswersWhetherItHasUsedAKeyOfTheHost)
+{
+    start();
+    clickContent();
+
+    EXPECT_EQ(m_view->onKeyDown(u'a', 0, 0), 1);
+    EXPECT_TRUE(has("key A"));
+    EXPECT_EQ(m_view->onKeyDown(u'b', 0, 0), 0);
+    EXPECT_EQ(m_view->onKeyDown(0, VirtualKey::Left, 0), 0);
+    EXPECT_TRUE(has("key cursor left"));
+    EXPECT_EQ(m_view->onKeyDown(0, VirtualKey::F12, KeyModifier::Shift | KeyModifier::Alt), 0);
+    EXPECT_TRUE(has("key shift + alt + F12"));
+    EXPECT_EQ(m_view->onKeyDown(0, 0, 0), 0);
+    EXPECT_EQ(m_view->onKeyUp(u'a', 0, 0), 0);
+    for (int count = 0; count < 5; ++count)
+        turn();
+    EXPECT_TRUE(m_windows->keys().empty());
+}
+
+TEST_F(JuceGuiAdapterTest, TakesTheKeyboardWhenTheHostSaysSo)
+{
+    start();
+    EXPECT_EQ(m_view->onFocus(true), ResultOk);
+    EXPECT_TRUE(turnUntil([this] { return m_content->hasKeyboardFocus(false); }));
+
+    m_user->press('a');
+    EXPECT_TRUE(turnUntil([this] { return has("key A"); }));
+}
+
+TEST_F(JuceGuiAdapterTest, FollowsTheSizeOfTheHost)
+{
+    start();
+    EXPECT_EQ(m_view->onSize({0, 0, 1500, 900}), ResultOk);
+    EXPECT_EQ(m_content->getBounds(), juce::Rectangle<int>(0, 0, 1500, 900));
+    EXPECT_EQ(size().right, 1500);
+
+    EXPECT_EQ(m_view->onSize({10, 20, 1310, 770}), ResultOk);
+    EXPECT_EQ(m_content->getBounds(), juce::Rectangle<int>(0, 0, 1300, 750));
+}
+
+TEST_F(JuceGuiAdapterTest, LeavesTheContentAsItIsAtASizeOfNothing)
+{
+    startServer();
+    makeView();
+    EXPECT_EQ(m_view->onSize({0, 0, 0, 750}), ResultOk);
+    EXPECT_EQ(m_view->getWidth(), 0);
+    EXPECT_EQ(m_content->getWidth(), 1300);
+    m_view->onSize({0, 0, 1300, 750});
+    open();
+
+    EXPECT_EQ(m_view->onSize({0, 0, 1300, 0}), ResultOk);
+    EXPECT_EQ(m_content->getBounds(), juce::Rectangle<int>(0, 0, 1300, 750));
+    EXPECT_EQ(m_view->onSize({0, 0, 1300, 750}), ResultOk);
+    EXPECT_EQ(m_content->getBounds(), juce::Rectangle<int>(0, 0, 1300, 750));
+}
+
+TEST_F(JuceGuiAdapterTest, AsksTheHostWhenTheContentWantsAnotherSize)
+{
+    start();
+    m_content->setSize(1400, 800);
+
+    EXPECT_EQ(size().right, 1400);
+    EXPECT_EQ(size().bottom, 800);
+    EXPECT_EQ(m_view->getBounds().getWidth(), 1400);
+}
+
+TEST_F(JuceGuiAdapterTest, PutsTheSizeBackThatTheHostRefuses)
+{
+    startServer();
+    makeView();
+    const auto ignore = [](standin::HostWindow&, bool) {};
+    m_window = makeCounted<standin::HostWindow>(*m_windows, standin::WindowDescription{"Window", "Test", false},
+                                                Counted<IPlugView>(m_view), ignore);
+    ASSERT_EQ(m_window->open(), ResultOk);
+
+    m_content->setSize(1400, 800);
+
+    EXPECT_EQ(m_content->getWidth(), 1300);
+    EXPECT_EQ(m_content->getHeight(), 750);
+    EXPECT_EQ(size().right, 1300);
+}
+
+TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerInASmallerWindow)
+{
+    start();
+
+    m_view->onSize({0, 0, 650, 750});
+    EXPECT_EQ(m_content->getWidth(), 1300);
+    EXPECT_EQ(m_content->getHeight(), 1500);
+    EXPECT_EQ(m_view->getLocalArea(m_content, m_content->getLocalBounds()), juce::Rectangle<int>(0, 0, 650, 750));
+}
+
+TEST_F(JuceGuiAdapterTest, HoldsToItsLeastSizeOrToTheScreens)
+{
+    startServer();
+    makeView();
+    ViewRect rect{0, 0, 1299, 749};
+    EXPECT_EQ(m_view->checkSizeConstraint(rect), ResultOk);
+    EXPECT_EQ(rect.right, 1300);
+    EXPECT_EQ(rect.bottom, 750);
+    rect = {5, 6, 1405, 906};
+    m_view->checkSizeConstraint(rect);
+    EXPECT_EQ(rect.right, 1405);
+    EXPECT_EQ(rect.bottom, 906);
+}
+
+TEST_F(JuceGuiAdapterTest, TakesASmallScreenForTheLeastSize)
+{
+    startServer(1024, 600);
+    makeView();
+    ViewRect rect{0, 0, 100, 100};
+    m_view->checkSizeConstraint(rect);
+
+    EXPECT_EQ(rect.right, 1024);
+    EXPECT_EQ(rect.bottom, 600);
+}
+
+TEST_F(JuceGuiAdapterTest, AsksForPhysicalPixelsOnAFineScreen)
+{
+    startServer(3200, 2000, 192);
+    makeView();
+    EXPECT_EQ(size().right, 1300);
+    open();
+
+    EXPECT_EQ(size().right, 2600);
+    EXPECT_EQ(size().bottom, 1500);
+    EXPECT_EQ(m_content->getWidth(), 1300);
+    EXPECT_EQ(m_content->getHeight(), 750);
+    EXPECT_TRUE(turnUntil([this] { return m_windows->colourAt(40 + 2590, 30 + 1490) == 0x336699; }));
+
+    m_user->moveTo(40 + 1000, 30 + 800);
+    m_user->click();
+    EXPECT_TRUE(turnUntil([this] { return has("mouse"); }));
+    EXPECT_EQ(m_content->place, juce::Point<int>(500, 400));
+}
+
+TEST_F(JuceGuiAdapterTest, LetsNoExceptionOfTheContentReachTheHost)
+{
+    start();
+    m_content->throws = true;
+    m_user->moveTo(540, 430);
+    m_user->click();
+    EXPECT_TRUE(turnUntil([this] { return has("mouse"); }));
+
+    m_content->throws = false;
+    m_calls.clear();
+    m_user->click();
+    EXPECT_TRUE(turnUntil([this] { return has("mouse"); }));
+}
+
+TEST_F(JuceGuiAdapterTest, EndsItsContentWhenItIsDisposedOf)
+{
+    start();
+    m_view->dispose();
+
+    EXPECT_TRUE(has("gone"));
+    EXPECT_FALSE(m_view->isOnDesktop());
+    EXPECT_EQ(m_view->onSize({0, 0, 1300, 750}), ResultOk);
+    EXPECT_EQ(m_view->onKeyDown(u'a', 0, 0), 0);
+    EXPECT_EQ(m_view->onFocus(true), ResultOk);
+    EXPECT_EQ(m_view->idle(), ResultOk);
+}
+
+TEST_F(JuceGuiAdapterTest, KeepsWhatItsContentWorksOn)
+{
+    startServer();
+    const auto engine = makeCounted<FObject>();
+    m_view = makeCounted<JuceGuiAdapter>(std::make_unique<Content>(m_calls), m_actions.get(), engine);
+    EXPECT_EQ(engine->refCount(), 2);
+
+    m_view.reset();
+    EXPECT_EQ(engine->refCount(), 1);
+}

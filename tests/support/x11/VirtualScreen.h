@@ -1,0 +1,28 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include <string>
+
+#include <sys/types.h>
+
+namespace cadrel::tests {
+
+/// An X server of its own for one test, without a window manager, with a screen of 1600 x 1000 unless told otherwise. While
+/// it lives, the environment names it as the display of this process.
+class VirtualScreen {
+public:
+    /// Throws std::runtime_error when the server doesn't start.
+    explicit VirtualScreen(int width = 1600, int height = 1000);
+    VirtualScreen(const VirtualScreen&) = delete;
+    VirtualScreen& operator=(const VirtualScreen&) = delete;
+    ~VirtualScreen();
+
+    /// What the user has set as dots per inch for all programs.
+    void setDpi(int dpi);
+
+private:
+    pid_t m_server = 0;
+};
+
+} // namespace cadrel::tests

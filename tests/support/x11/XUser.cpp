@@ -1,0 +1,75 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "tests/support/x11/XUser.h"
+
+#include <X11/Xlib.h>
+#include <X11/extensions/XTest.h>
+
+#include <stdexcept>
+
+namespace cadrel::tests {
+
+XUser::XUser() : m_display(XOpenDisplay(nullptr))
+{
+    if (!m_display)
+        throw std::runtime_error("no display");
+}
+
+XUser::~XUser()
+{
+    XCloseDisplay(m_display);
+}
+
+void XUser::moveTo(int x, int y)
+{
+    XTestFakeMotionEvent(m_display, -1, x, y, CurrentTime);
+    XSync(m_display, False);
+}
+
+void XUser::button(unsigned int number)
+{
+    XTestFakeButtonEvent(m_display, number, True, CurrentTime);
+    XTestFakeButtonEvent(m_display, number, False, CurrentTime);
+    XSync(m_display, False);
+}
+
+void XUser::click()
+{
+    button(1);
+}
+
+void XUser::wheelUp()
+{
+    button(4);
+}
+
+void XUser::press(unsigned long key, unsigned long held, unsigned long heldToo)
+{
+    const auto change = [this](unsigned long symbol, bool isDown) {
+        if (symbol != 0)
+            XTestFakeKeyEvent(m_display, XKeysymToKeycode(m_display, symbol), isDown ? True : False, CurrentTime);
+    };
+    change(held, true);
+    change(heldToo, true);
+    change(key, true);
+    change(key, false);
+    change(heldToo, false);
+    change(held, false);
+    XSync(m_display, False);
+}
+
+unsigned long XUser::focus() const
+{
+    Window window = 0;
+    int revert = 0;
+    XGetInputFocus(m_display, &window, &revert);
+    return window;
+}
+
+void XUser::setFocus(unsigned long window)
+{
+    XSetInputFocus(m_display, window, RevertToParent, CurrentTime);
+    XSync(m_display, False);
+}
+
+} // namespace cadrel::tests

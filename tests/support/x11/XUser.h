@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+struct _XDisplay;
+
+namespace cadrel::tests {
+
+/// Mouse and keyboard of the screen, moved by a test. Places are pixels of the screen.
+class XUser {
+public:
+    XUser();
+    XUser(const XUser&) = delete;
+    XUser& operator=(const XUser&) = delete;
+    ~XUser();
+
+    void moveTo(int x, int y);
+    /// Where the mouse is.
+    void click();
+    /// One notch.
+    void wheelUp();
+    /// By keysym, with the key of another keysym held where that isn't 0.
+    void press(unsigned long key, unsigned long held = 0, unsigned long heldToo = 0);
+    /// Which window has the keyboard.
+    unsigned long focus() const;
+    void setFocus(unsigned long window);
+
+private:
+    void button(unsigned int number);
+
+    _XDisplay* m_display;
+};
+
+} // namespace cadrel::tests

@@ -1,0 +1,133 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "tests/support/x11/XWindows.h"
+
+#include "velmark/PlugView.h"
+
+#include <X11/Xlib.h>
+#include <X11/Xutil.h>
+
+#include <cstdint>
+#include <stdexcept>
+
+namespace cadrel::tests {
+
+class XWindows::XWindow : public standin::NativeWindow {
+public:
+    XWindow(XWindows& owner, const std::string& title, int width, int height, Listener& listener)
+        : m_owner(owner), m_listener(listener)
+    {
+        Display* const display = m_owner.m_display;
+        m_window = XCreateSimpleWindow(display, DefaultRootWindow(display), 40, 30, static_cast<unsigned>(width),
+                                       static_cast<unsigned>(height), 0, 0, 0);
+        XStoreName(display, m_window, title.c_str());
+        XSelectInput(display, m_window, StructureNotifyMask | FocusChangeMask | KeyPressMask);
+        m_owner.m_windows[m_window] = this;
+        XSync(display, False);
+    }
+    ~XWindow() override
+    {
+        m_owner.m_windows.erase(m_window);
+        if (m_isThere)
+            XDestroyWindow(m_owner.m_display, m_window);
+        XSync(m_owner.m_display, False);
+    }
+
+    void* parent() override { return reinterpret_cast<void*>(static_cast<std::uintptr_t>(m_window)); }
+    void setSize(std::int32_t width, std::int32_t height) override
+    {
+        XResizeWindow(m_owner.m_display, m_window, static_cast<unsigned>(width), static_cast<unsigned>(height));
+        XSync(m_owner.m_display, False);
+    }
+    void show() override
+    {
+        XMapRaised(m_owner.m_display, m_window);
+        XSync(m_owner.m_display, False);
+    }
+
+    void tell(const XEvent& event)
+    {
+        switch (event.type) {
+        case ConfigureNotify:
+            if (event.xconfigure.width == m_width && event.xconfigure.height == m_height)
+                break;
+            m_width = event.xconfigure.width;
+            m_height = event.xconfigure.height;
+            m_listener.resizedByUser(m_width, m_height);
+            break;
+        case FocusIn:
+        case FocusOut:
+            if (event.xfocus.detail != NotifyInferior)
+                m_listener.focusChanged(event.type == FocusIn);
+            break;
+        case KeyPress: {
+            XKeyEvent key = event.xkey;
+            m_owner.m_keys.push_back(XLookupKeysym(&key, 0));
+            break;
+        }
+        case DestroyNotify:
+            m_isThere = m_isThere && event.xdestroywindow.window != m_window;
+            break;
+        default:
+            break;
+        }
+    }
+
+private:
+    XWindows& m_owner;
+    Listener& m_listener;
+    Window m_window;
+    int m_width = 0;
+    int m_height = 0;
+    bool m_isThere = true;
+};
+
+XWindows::XWindows() : m_display(XOpenDisplay(nullptr))
+{
+    if (!m_display)
+        throw std::runtime_error("no display");
+}
+
+XWindows::~XWindows()
+{
+    XCloseDisplay(m_display);
+}
+
+const char* XWindows::parentType() const
+{
+    return Velmark::ParentType::X11Window;
+}
+
+std::unique_ptr<standin::NativeWindow> XWindows::createWindow(const std::string& title, std::int32_t width,
+                                                              std::int32_t height,
+                                                              standin::NativeWindow::Listener& listener)
+{
+    return std::make_unique<XWindow>(*this, title, width, height, listener);
+}
+
+void XWindows::serve()
+{
+    while (XPending(m_display) > 0) {
+        XEvent event;
+        XNextEvent(m_display, &event);
+        const auto window = m_windows.find(event.xany.window);
+        if (window != m_windows.end())
+            window->second->tell(event);
+    }
+}
+
+void XWindows::destroy(standin::NativeWindow& window)
+{
+    XDestroyWindow(m_display, static_cast<Window>(reinterpret_cast<std::uintptr_t>(window.parent())));
+    XSync(m_display, False);
+}
+
+unsigned long XWindows::colourAt(int x, int y) const
+{
+    XImage* const image = XGetImage(m_display, DefaultRootWindow(m_display), x, y, 1, 1, AllPlanes, ZPixmap);
+    const unsigned long colour = XGetPixel(image, 0, 0) & 0xffffffUL;
+    XDestroyImage(image);
+    return colour;
+}
+
+} // namespace cadrel::tests

@@ -1,0 +1,46 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "standin/window/WindowSystem.h"
+
+#include <map>
+#include <vector>
+
+// Xlib's macros and other headers don't go together, so that this one names nothing of Xlib's.
+struct _XDisplay;
+
+namespace cadrel::tests {
+
+/// The windows of a host in plain Xlib. An X error ends the process, as it does in any program that installs no handler.
+class XWindows : public standin::WindowSystem {
+public:
+    XWindows();
+    XWindows(const XWindows&) = delete;
+    XWindows& operator=(const XWindows&) = delete;
+    ~XWindows() override;
+
+    const char* parentType() const override;
+    std::unique_ptr<standin::NativeWindow> createWindow(const std::string& title, std::int32_t width,
+                                                        std::int32_t height,
+                                                        standin::NativeWindow::Listener& listener) override;
+
+    /// Tells what has come from the server.
+    void serve();
+
+    /// The keys that came to a window of the host, by their symbols.
+    const std::vector<unsigned long>& keys() const { return m_keys; }
+    /// Ends a window behind the back of whoever has it.
+    void destroy(standin::NativeWindow& window);
+    /// What the screen shows at a place, as 0xRRGGBB.
+    unsigned long colourAt(int x, int y) const;
+
+private:
+    class XWindow;
+
+    _XDisplay* m_display;
+    std::map<unsigned long, XWindow*> m_windows;
+    std::vector<unsigned long> m_keys;
+};
+
+} // namespace cadrel::tests
