@@ -101,8 +101,8 @@ double slowestNotes(const std::string& program, const std::filesystem::path& fol
     writeEdl(stem + "_new.edl", recut(oldCut, 2'000));
     double slowest = 0;
     for (const char* const extension : {".txt", ".csv", ".json", ".html", ".pdf"}) {
-        const double seconds = medianSeconds(
-            {program, "notes", "--old", stem + "_old.edl", "--new", stem + "_new.edl", "-o", stem + extension});
+        const double seconds = medianSeconds({program, "notes", "--old", stem + "_old.edl", "--new", stem + "_new.edl",
+                                              "-o", stem + extension, "--overwrite"});
         slowest = std::max(slowest, seconds);
     }
     return slowest;
@@ -115,7 +115,8 @@ std::vector<std::string> generateCommand(const std::string& program, const std::
     const Cut oldCut = makeCut(shotCount);
     writeEdl(stem + "_old.edl", oldCut);
     writeEdl(stem + "_new.edl", recut(oldCut, shotCount / 100));
-    return {program, "generate", "--old", stem + "_old.edl", "--new", stem + "_new.edl", "-o", stem + "_change.edl"};
+    return {program, "generate",           "--old",      stem + "_old.edl", "--new", stem + "_new.edl",
+            "-o",    stem + "_change.edl", "--overwrite"};
 }
 
 /// A project whose one track has so many clips, each half as long as all of them together.
@@ -145,8 +146,8 @@ std::vector<std::string> applyCommand(const std::string& program, const std::fil
     writeEdl(stem + "_old.edl", oldCut);
     writeEdl(stem + "_new.edl", recut(oldCut, 4));
     writeStackedProject(stem + ".stage", clipCount);
-    return {program,           "apply", stem + ".stage",     "--old",    stem + "_old.edl", "--new",
-            stem + "_new.edl", "-o",    stem + "_new.stage", "--summary"};
+    return {program,           "apply", stem + ".stage",     "--old",       stem + "_old.edl", "--new",
+            stem + "_new.edl", "-o",    stem + "_new.stage", "--overwrite", "--summary"};
 }
 
 /// A project of many tracks for a film of 100,000 events: clips end to end, and a curve with as many points.
@@ -184,8 +185,8 @@ std::vector<std::string> planCommand(const std::string& program, const std::file
         std::accumulate(cut.begin(), cut.end(), 0.0, [](double sum, const Shot& shot) { return sum + shot.length; });
     writeEdl(stem + ".edl", cut);
     writeWideProject(stem + ".stage", frames / 24.0);
-    return {program,       "apply", stem + ".stage",     "--old",    stem + ".edl", "--new",
-            stem + ".edl", "-o",    stem + "_new.stage", "--summary"};
+    return {program,       "apply", stem + ".stage",     "--old",       stem + ".edl", "--new",
+            stem + ".edl", "-o",    stem + "_new.stage", "--overwrite", "--summary"};
 }
 
 bool run(const std::string& program, const std::filesystem::path& folder)

@@ -112,7 +112,15 @@ void Project::load()
 {
     findLockedTracks();
     FirstFailure failure;
-    failure.ofStep([this] { readModel(); });
+    failure.ofStep([this] {
+        try {
+            readModel();
+        } catch (...) {
+            // The model has emptied itself, but for the VFX patterns that it has read.
+            m_model.settings() = core::Settings();
+            throw;
+        }
+    });
     if (m_model.isPreviewActive()) {
         findPreviewedTracks();
     } else {
