@@ -3,7 +3,9 @@
 #include "app/CommandLine.h"
 
 #include "app/console/Failure.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Nearest.h"
+#include "app/console/Output.h"
+#include "app/console/Replacing.h"
 #include "app/console/Wording.h"
 #include "app/edl/ProjectFramerate.h"
 #include "app/settings/SettingsTable.h"
@@ -13,8 +15,10 @@
 #include <algorithm>
 #include <array>
 #include <cstdint>
+#include <functional>
 #include <iterator>
 #include <string>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -130,6 +134,14 @@ void addOutput(CLI::App& command, const char* name, std::string& file, const cha
     command.add_option(name, file, help)->check(isNamed)->type_name("FILE");
 }
 
+/// The file that the command is for.
+void addResult(CLI::App& command, std::string& file, Replacing& replacing, const char* help)
+{
+    addOutput(command, "-o,--output", file, help);
+    command.add_flag("--overwrite", replacing.isAllowed, "Replace the file of -o where it exists");
+    command.add_flag("--backup", replacing.keepsFormer, "Keep what is replaced, as NAME_backup_1 and so on");
+}
+
 CLI::Option* addFiles(CLI::App& command, const char* name, std::vector<std::string>& files, const char* help)
 {
     return command.add_option(name, files, help)->type_name("FILE");
@@ -194,9 +206,8 @@ public:
         return m_command
             .add_flag_function(
                 option() + ",!" + offOption(),
-                [&given = m_given, kind](std::int64_t count) {
-                    given.changes.emplace_back(
-                        [kind, isOn = count > 0](Settings& settings) { settings.set(kind.option, isOn); });
+                [add = adder(), kind](std::int64_t count) {
+                    add([kind, isOn = count > 0](Settings& settings) { settings.set(kind.option, isOn); });
                 },
                 m_entry.help)
             ->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
@@ -207,8 +218,8 @@ public:
         return m_command
             .add_option_function<std::string>(
                 option(),
-                [&given = m_given, kind](const std::string& word) {
-                    given.changes.emplace_back([kind, number = numberOf(word, kind.words)](Settings& settings) {
+                [add = adder(), kind](const std::string& word) {
+                    add([kind, number = numberOf(word, kind.words)](Settings& settings) {
                         settings.set(kind.option, number);
                     });
                 },
@@ -222,9 +233,8 @@ public:
         return m_command
             .add_option_function<std::int32_t>(
                 option(),
-                [&given = m_given, kind](std::int32_t frames) {
-                    given.changes.emplace_back(
-                        [kind, frames](Settings& settings) { settings.set(kind.option, frames); });
+                [add = adder(), kind](std::int32_t frames) {
+                    add([kind, frames](Settings& settings) { settings.set(kind.option, frames); });
                 },
                 m_entry.help)
             ->check(CLI::Range(0, MostFrames))
@@ -237,8 +247,8 @@ public:
         CLI::Option* const bound = m_command
                                        .add_option_function<Number>(
                                            option(),
-                                           [&given = m_given, kind](Number number) {
-                                               given.changes.emplace_back([kind, number](Settings& settings) {
+                                           [add = adder(), kind](Number number) {
+                                               add([kind, number](Settings& settings) {
                                                    settings.set(kind.isOn, true);
                                                    settings.set(kind.bound, number);
                                                });
@@ -261,21 +271,28 @@ public:
     CLI::Option* operator()(const VfxSetting&) const
     {
         return m_command.add_option(option(), m_given.vfxPatterns, m_entry.help)
-            ->type_name("PREFIX,POSTFIX")
+            ->type_name("PREFIX,POSTFIX|none")
             ->allow_extra_args(false);
     }
 
 private:
+    using Apply = std::function<void(Settings&)>;
+
+    /// Puts a change of this setting to what is given.
+    std::function<void(Apply)> adder() const
+    {
+        return [&given = m_given, &entry = m_entry](Apply apply) {
+            given.changes.push_back({&entry, std::move(apply)});
+        };
+    }
+
     std::string option() const { return std::string("--") + m_entry.name; }
     std::string offOption() const { return std::string("--no-") + m_entry.name; }
 
     CLI::Option* addOff(core::Option<bool> Settings::*isOn, const char* help) const
     {
         return m_command.add_flag_callback(
-            offOption(),
-            [&given = m_given, isOn] {
-                given.changes.emplace_back([isOn](Settings& settings) { settings.set(isOn, false); });
-            },
+            offOption(), [add = adder(), isOn] { add([isOn](Settings& settings) { settings.set(isOn, false); }); },
             help);
     }
 
@@ -303,7 +320,7 @@ CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
     CLI::App* const generate = program.add_subcommand("generate", "Make the change EDL from an old and a new cut");
     addFiles(*generate, "--old", options.generation.oldFiles, "EDLs of the old cut, in order")->required();
     addFiles(*generate, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
-    addOutput(*generate, "-o,--output", options.changeFile, "Where to write the change EDL");
+    addResult(*generate, options.changeFile, options.replacing, "Where to write the change EDL");
     addOutput(*generate, "--json", options.jsonFile, EventsJsonHelp);
     addMatching(*generate, options.generation.settings);
     addShift(*generate, options.generation.shifts);
@@ -325,7 +342,7 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
         addFiles(*apply, "--change", options.changeFiles, "A change EDL instead, in one file or several")
             ->excludes(oldFiles)
             ->excludes(newFiles);
-    addOutput(*apply, "-o,--output", options.outputFile, "Where to write the project");
+    addResult(*apply, options.outputFile, options.replacing, "Where to write the project");
     apply->add_flag("--in-place", options.inPlace, "Replace the project itself")->excludes("--output");
     addOutput(*apply, "--json", options.jsonFile, AllJsonHelp);
     apply->add_flag("--summary", options.summary, "Print the totals alone");
@@ -339,6 +356,8 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
         ->check(CLI::IsMember(wordList(KeepWords)))
         ->type_name("WHAT");
     apply->add_flag("--force", options.isForced, "Go on where the files don't seem to belong together");
+    apply->add_flag("--fresh", options.isFresh,
+                    "Begin anew, without the settings and cuts that earlier runs have stored");
     addShift(*apply, options.generation.shifts);
     addRate(*apply, options.generation.load, "Stop when the project has another frame rate");
     addStrict(*apply, options.generation.load);
@@ -357,7 +376,8 @@ CLI::App* addNotes(CLI::App& program, NotesOptions& options)
     CLI::App* const notes = program.add_subcommand("notes", "Tell what has changed between two cuts, step by step");
     addFiles(*notes, "--old", options.generation.oldFiles, "EDLs of the old cut, in order")->required();
     addFiles(*notes, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
-    addOutput(*notes, "-o,--output", options.outputFile, "Where to write the notes: .html, .pdf, .csv, .txt or .json");
+    addResult(*notes, options.outputFile, options.replacing,
+              "Where to write the notes: .html, .pdf, .csv, .txt or .json");
     notes
         ->add_option("--simplify", options.simplify,
                      "Join trims that cancel out within so many frames into one step (default 0, none)")
@@ -403,6 +423,51 @@ CLI::App* addShow(CLI::App& program, ShowOptions& options)
     return show;
 }
 
+std::vector<std::string> commandNames(const CLI::App& program)
+{
+    std::vector<std::string> names;
+    for (const CLI::App* const command : program.get_subcommands([](const CLI::App*) { return true; }))
+        names.push_back(command->get_name());
+    return names;
+}
+
+/// With their dashes.
+std::vector<std::string> optionNames(const CLI::App& command)
+{
+    std::vector<std::string> names;
+    for (const CLI::Option* const option : command.get_options()) {
+        for (const std::string& name : option->get_lnames())
+            names.push_back("--" + name);
+    }
+    return names;
+}
+
+/// Throws UsageError for a word that isn't one of those.
+void requireKnown(const char* kind, const std::string& typed, const std::vector<std::string>& words)
+{
+    if (std::find(words.begin(), words.end(), typed) != words.end())
+        return;
+    const std::string nearest = nearestWord(typed, words);
+    throw UsageError{std::string("there is no ") + kind + " " + typed,
+                     nearest.empty() ? "see --help" : "did you mean " + nearest + "?"};
+}
+
+/// Throws UsageError for the first command or option that there isn't: the parser may complain of what is missing instead.
+void requireKnownWords(const CLI::App& program, const std::vector<std::string>& arguments)
+{
+    const CLI::App* command = &program;
+    for (const std::string& argument : arguments) {
+        if (argument == "--")
+            return;
+        if (argument.starts_with("--")) {
+            requireKnown("option", argument.substr(0, argument.find('=')), optionNames(*command));
+        } else if (command == &program && !argument.starts_with("-")) {
+            requireKnown("command", argument, commandNames(program));
+            command = program.get_subcommand(argument);
+        }
+    }
+}
+
 } // namespace
 
 std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
@@ -421,8 +486,10 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
     try {
         program.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
-        if (error.get_exit_code() != 0)
+        if (error.get_exit_code() != 0) {
+            requireKnownWords(program, {argv + 1, argv + argc});
             throw UsageError{error.what()};
+        }
         program.exit(error); // --help and --version
         flushStandardOutput();
         return std::nullopt;

@@ -11,6 +11,8 @@
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
+#include <csignal>
+#include <cstdlib>
 #include <exception>
 #include <iostream>
 #include <new>
@@ -51,6 +53,35 @@ void run(int argc, char** argv, Terminal& terminal)
     }
 }
 
+bool isOutOfMemory = false;
+
+/// Much is caught on the way up and becomes a failure of another kind, so that it has to be known here what was the cause.
+void rememberLackOfMemory()
+{
+    isOutOfMemory = true;
+    throw std::bad_alloc();
+}
+
+Failure lackOfMemory()
+{
+    return {"memory", "there is not enough of it", "split the files or close other programs"};
+}
+
+/// Reports why the work stopped.
+void report(Terminal& terminal, const Failure& failure)
+{
+    terminal.report(isOutOfMemory ? lackOfMemory() : failure);
+}
+
+/// An exception in a place that none may leave ends the program at once. That happens only where memory runs out.
+[[noreturn]] void endForLackOfMemory()
+{
+    if (!isOutOfMemory)
+        std::abort();
+    Terminal().report(lackOfMemory());
+    std::_Exit(WorkStopped);
+}
+
 /// Every exception ends the program with a message.
 int runToStatus(int argc, char** argv, Terminal& terminal)
 {
@@ -61,15 +92,13 @@ int runToStatus(int argc, char** argv, Terminal& terminal)
         terminal.report(error);
         return WrongUsage;
     } catch (const Failure& failure) {
-        terminal.report(failure);
+        report(terminal, failure);
     } catch (const app::Interruption::Requested&) {
         terminal.clearProgress();
-    } catch (const std::bad_alloc&) {
-        terminal.report(Failure{"memory", "there is not enough of it", "split the files or close other programs"});
     } catch (const util::Result::Type& result) {
-        terminal.report(Failure{"internal", "failure " + std::to_string(result), "report it with the files"});
+        report(terminal, Failure{"internal", "failure " + std::to_string(result), "report it with the files"});
     } catch (const std::exception& exception) {
-        terminal.report(Failure{"internal", exception.what(), "report it with the files"});
+        report(terminal, Failure{"internal", exception.what(), "report it with the files"});
     }
     return WorkStopped;
 }
@@ -79,6 +108,10 @@ int runToStatus(int argc, char** argv, Terminal& terminal)
 int main(int argc, char** argv)
 {
     std::ios::sync_with_stdio(false);
+    std::set_new_handler(rememberLackOfMemory);
+    std::set_terminate(endForLackOfMemory);
+    // Where a file may not grow any further, the write fails instead, and what is half written is removed.
+    std::signal(SIGXFSZ, SIG_IGN);
     const app::PlainStringConverter converter;
     util::StringUtil::setConverter(&converter);
     Terminal terminal;

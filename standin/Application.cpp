@@ -114,11 +114,12 @@ Project& Application::openProject(const fs::path& file)
     return projects().add(project);
 }
 
-void Application::saveProject(Project& project, const fs::path& file)
+void Application::saveProject(Project& project, const fs::path& file,
+                              const std::optional<cadrel::util::FileStamp>& expected)
 {
     std::u16string path = fullPathOf(file);
     project.announceStoring();
-    ProjectFile::write(project, file);
+    ProjectFile::write(project, file, expected);
     if (path == project.path())
         return;
     project.setPath(std::move(path));

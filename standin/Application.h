@@ -4,11 +4,13 @@
 
 #include "standin/services/MenuRegistry.h"
 #include "standin/services/Terminal.h"
+#include "util/FileStamp.h"
 #include "velmark/Context.h"
 #include "velmark/Counted.h"
 
 #include <filesystem>
 #include <memory>
+#include <optional>
 
 namespace standin {
 
@@ -46,9 +48,10 @@ public:
     Project& createProject();
     /// Reads a project file and tells the listeners. Throws ProjectFileError; nothing is opened then.
     Project& openProject(const std::filesystem::path& file);
-    /// Lets the listeners store what they have, and writes the project. Throws ProjectFileError, with the former file
-    /// untouched.
-    void saveProject(Project& project, const std::filesystem::path& file);
+    /// Lets the listeners store what they have, and writes the project. With an `expected` stamp the file has to be as it was
+    /// then; else ProjectFileChanged is thrown. Throws ProjectFileError, with the former file untouched.
+    void saveProject(Project& project, const std::filesystem::path& file,
+                     const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
     /// Null makes none active.
     void activateProject(Project* project);
     /// Commits the transaction if one is open.

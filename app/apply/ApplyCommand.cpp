@@ -12,7 +12,7 @@
 #include "app/apply/RunMaterial.h"
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
@@ -22,11 +22,13 @@
 #include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
+#include "core/keep/PastRuns.h"
 #include "core/model/DataModel.h"
 #include "core/time/SecondsRange.h"
 #include "core/time/Timecode.h"
 #include "standin/base/Times.h"
 #include "standin/project/Project.h"
+#include "util/Result.h"
 
 #include <algorithm>
 #include <chrono>
@@ -57,7 +59,8 @@ const std::string& targetOf(const ApplyOptions& options)
     return options.inPlace ? options.projectFile : options.outputFile;
 }
 
-/// Throws UsageError when an output would overwrite another file of this run.
+/// Throws UsageError when an output would overwrite another file of this run, and Failure when it would overwrite one that the
+/// user hasn't given up.
 void checkOutputs(const ApplyOptions& options)
 {
     if (options.outputFile == "-")
@@ -70,11 +73,26 @@ void checkOutputs(const ApplyOptions& options)
         if (isSameFile(options.projectFile, options.outputFile))
             throw UsageError{options.outputFile + ": is the project itself", "give --in-place to replace it"};
         refuseToOverwrite(taken, options.outputFile);
+        requireReplaceable({options.outputFile}, options.replacing);
         taken.push_back(options.outputFile);
     }
     taken.push_back(options.projectFile);
-    if (JsonOutput::isFile(options.jsonFile))
+    if (Output::isFile(options.jsonFile))
         refuseToOverwrite(taken, options.jsonFile);
+}
+
+HostedProject::Opening openingOf(const ApplyOptions& options)
+{
+    if (!options.isFresh)
+        return HostedProject::Opening::WithStored;
+    return options.inPlace ? HostedProject::Opening::FreshInPlace : HostedProject::Opening::Fresh;
+}
+
+/// Leaves the model as that of a project without any run. The settings forget their VFX patterns, too.
+void forgetStored(DataModel& model)
+{
+    model.reset();
+    model.settings() = Settings();
 }
 
 /// Throws Failure when the project doesn't run at the rate that the user gave.
@@ -286,6 +304,28 @@ FrameRanges sourcesOf(const DataModel& model, const KeptRun* kept)
     return sources;
 }
 
+/// The runs that the project has behind it; the lists of the model tell of the last.
+core::PastRuns pastRunsOf(const DataModel& model)
+{
+    const Settings& settings = model.settings();
+    core::PastRuns runs({settings.matchBy(), settings.vfxPatterns(), Timecode::framerate()});
+    core::Variant stored;
+    if (model.getProperty(core::PropertyKey::EarlierRuns, stored) == util::Result::Ok)
+        runs.read(stored.toText());
+    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl());
+    return runs;
+}
+
+/// Lets the project keep of the runs behind it what that of the model's lists leaves.
+void remember(core::PastRuns& runs, DataModel& model)
+{
+    runs.forgetHiddenBy(model.oldEdl(), model.newEdl(), model.changeEdl());
+    if (runs.isEmpty())
+        model.removeProperty(core::PropertyKey::EarlierRuns);
+    else
+        model.setProperty(core::PropertyKey::EarlierRuns, core::Variant(runs.toBytes()));
+}
+
 /// What the run is going to be, and what is known of it before.
 class Preparation {
 public:
@@ -294,18 +334,21 @@ public:
         : m_hosted(hosted), m_clock(clock), m_options(options), m_edls(edlsOf(options)), m_facts(hosted.model())
     {
         DataModel& model = hosted.model();
-        EventList lastCut;
-        lastCut.append(model.newEdl().release());
+        core::PastRuns runs = pastRunsOf(model);
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
         m_facts.changeNames = source.files.names;
         m_facts.changeUnread = source.files.unread;
+        m_facts.settings.emplace(model.settings(), options.generation.settings, source.cuts.has_value(),
+                                 timeText(hosted.project(), clock));
         m_facts.written = targetOf(options);
-        m_facts.jsonFile = JsonOutput::isFile(options.jsonFile) ? options.jsonFile : std::string();
+        m_facts.jsonFile = Output::isFile(options.jsonFile) ? options.jsonFile : std::string();
         const Plausibility plausibility(model, options.projectFile, m_edls);
         if (source.cuts)
-            checkCuts(plausibility, lastCut, terminal);
+            checkCuts(plausibility, runs, terminal);
+        require(plausibility.doubtOfChanges(runs, !source.cuts), options);
+        remember(runs, model);
         plan(source.cuts.has_value());
         if (source.cuts) {
             require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options);
@@ -320,9 +363,9 @@ public:
 private:
     bool isPlanned(const ChangeSource& source) const { return m_kept && source.cuts; }
 
-    void checkCuts(const Plausibility& plausibility, const EventList& lastCut, Terminal& terminal)
+    void checkCuts(const Plausibility& plausibility, const core::PastRuns& runs, Terminal& terminal)
     {
-        require(plausibility.doubtOfLastCut(lastCut), m_options);
+        require(plausibility.doubtOfLastCut(runs), m_options);
         require(plausibility.doubtOfNames(), m_options);
         require(plausibility.doubtOfSound(m_hosted.project()), m_options);
         if (const auto dull = plausibility.dullNames()) {
@@ -345,6 +388,7 @@ private:
         m_kept.emplace(model, m_hosted.project(), m_clock,
                        isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_options.isForced, m_edls);
         m_facts.isRunNeeded = m_kept->needsRun();
+        m_facts.isHeldBack = m_kept->plan().isHeldBack;
         const Framerate framerate = Timecode::framerate();
         for (const core::FrameRange& range : m_kept->plan().lost)
             m_facts.lost.push_back({range.start / framerate.rate, range.end / framerate.rate});
@@ -381,26 +425,47 @@ void apply(HostedProject& hosted, const KeptRun* kept, ApplyFacts& facts)
     facts.tracks = compare(before, hosted.project(), shiftOf(hosted.model(), kept, facts.timeOrigin));
 }
 
-/// Writes the files of the run, all or none. Throws Failure.
-void write(HostedProject& hosted, const ApplyJson& report, const ApplyOptions& options)
+void writeReport(Output& output, const core::DataModel& model, const ApplyJson& report)
 {
-    std::optional<JsonOutput> json;
-    if (!options.jsonFile.empty()) {
-        json.emplace(options.jsonFile);
-        EventJson::write(
-            hosted.model().changeEdl().events(), report.toJson(), [&](std::string_view text) { json->write(text); },
-            [&](std::size_t index) { return report.partsOf(index); });
-        json->finish();
-    }
-    Interruption::check();
-    if (!targetOf(options).empty())
-        hosted.save(targetOf(options));
-    if (json)
-        json->keep();
+    EventJson::write(
+        model.changeEdl().events(), report.toJson(), [&](std::string_view text) { output.write(text); },
+        [&](std::size_t index) { return report.partsOf(index); });
 }
 
-void print(const ApplyListing& listing, const ApplyOptions& options)
+/// Writes the files of the run. What can fail is done before the project is written, so that there is a report of every
+/// project that is, and no report of another. Throws Failure.
+void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, const ApplyOptions& options)
 {
+    const std::string& target = targetOf(options);
+    Backups backups(options.replacing.keepsFormer ? std::vector{target} : std::vector<std::string>());
+    facts.backups = backups.names();
+    std::optional<Output> report;
+    if (Output::isFile(options.jsonFile)) {
+        report.emplace(options.jsonFile);
+        writeReport(*report, hosted.model(), ApplyJson(facts, clock));
+        report->finish();
+    }
+    Interruption::check();
+    if (options.inPlace)
+        hosted.saveInPlace();
+    else if (!target.empty() && options.replacing.isAllowed)
+        hosted.saveOver(target);
+    else if (!target.empty())
+        hosted.saveAs(target);
+    backups.keep();
+    if (report)
+        report->place();
+}
+
+void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyOptions& options)
+{
+    if (Output::isStandardOutput(options.jsonFile)) {
+        Output output(options.jsonFile);
+        writeReport(output, facts.model, ApplyJson(facts, clock));
+        output.place();
+        return;
+    }
+    const ApplyListing listing(facts, clock);
     listing.printTotals(std::cout);
     if (!options.summary) {
         std::cout << '\n';
@@ -421,10 +486,12 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     shiftsOf(options);
 
     terminal.showProgress("reading " + fileNameOf(options.projectFile));
-    HostedProject hosted(options.projectFile, terminal);
+    HostedProject hosted(options.projectFile, terminal, openingOf(options));
     const ProjectClock clock = clockOf(hosted.project(), options.projectFile);
     requireRate(options, clock);
     hosted.endPreview();
+    if (options.isFresh)
+        forgetStored(hosted.model());
     configure(hosted.model().settings(), options.generation.settings);
     restrictRange(hosted.model().settings(), options.generation.settings.preserve);
     Preparation run(hosted, clock, options, terminal);
@@ -434,12 +501,11 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     terminal.clearProgress();
     apply(hosted, run.kept(), facts);
     terminal.showProgress("writing");
-    write(hosted, ApplyJson(facts, clock), options);
+    write(hosted, clock, facts, options);
     interruption.reset();
 
     terminal.clearProgress();
-    if (!JsonOutput::isStandardOutput(options.jsonFile))
-        print(ApplyListing(facts, clock), options);
+    print(facts, clock, options);
 }
 
 } // namespace cadrel::app

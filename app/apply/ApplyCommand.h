@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "app/console/Replacing.h"
 #include "app/edl/Generation.h"
 
 #include <string>
@@ -21,15 +22,17 @@ struct ApplyOptions {
     GenerationOptions generation;         ///< no files where there is a change EDL
     std::vector<std::string> changeFiles; ///< a change EDL, in order
     std::string outputFile;               ///< empty: none is written, but for `inPlace`
+    Replacing replacing;                  ///< of the output; in place the project is replaced anyway
     std::string jsonFile;                 ///< empty: none is written; "-": standard output
     Keep keep = Keep::All;
     bool isForced = false; ///< goes on where the files don't seem to belong together
+    bool isFresh = false;  ///< without what earlier runs have stored in the project
     bool inPlace = false;  ///< the result replaces the project
     bool summary = false;  ///< the totals alone
 };
 
-/// `cadrel apply`: carries a sound project over to a new cut. The files appear together when all has gone well, or not
-/// at all. If the user interrupts the run, they stay as they were. Throws Failure and UsageError.
+/// `cadrel apply`: carries a sound project over to a new cut. The report is prepared before the project is written,
+/// and takes its place after it. If the run fails or the user interrupts it, all files stay as they were. Throws Failure and UsageError.
 void runApply(const ApplyOptions& options, Terminal& terminal);
 
 } // namespace cadrel::app

@@ -4,6 +4,7 @@
 
 #include "app/apply/ProjectComparison.h"
 #include "app/edl/GenerationReport.h"
+#include "app/settings/SettingsReport.h"
 #include "core/keep/KeepPlan.h"
 #include "core/time/SecondsRange.h"
 
@@ -36,6 +37,7 @@ struct ApplyFacts {
 
     const core::DataModel& model;
     std::string projectName;
+    std::optional<SettingsReport> settings;
     double timeOrigin = 0.0;                    ///< of the project
     std::optional<GenerationReport> generation; ///< nothing where the change EDL was given
     std::vector<std::string> changeNames;       ///< its files then
@@ -43,14 +45,16 @@ struct ApplyFacts {
     std::vector<PassedOver> passedOver;
     std::size_t appliedCount = 0;
     bool isRunNeeded = true; ///< false: the project is as the new cut needs it
+    bool isHeldBack = false; ///< all that would change stands where the user lets nothing change
     /// For each event of the change list where its stretches are from; empty where all are from the cut.
     std::vector<core::KeptEvent> kept;
     std::vector<core::SecondsRange> lost; ///< what goes although no picture stands there; by the project's clock
     std::string matchText;                ///< what the match rests on; empty where the names tell the shots apart
     std::vector<TrackComparison> tracks;
-    double seconds = 0.0; ///< that the run took
-    std::string written;  ///< the project file; empty for none
-    std::string jsonFile; ///< the file of the report; empty for none
+    double seconds = 0.0;             ///< that the run took
+    std::string written;              ///< the project file; empty for none
+    std::vector<std::string> backups; ///< the former file under its new name; empty for none
+    std::string jsonFile;             ///< the file of the report; empty for none
 };
 
 /// How many clips and markers became what. One that was moved and trimmed counts in both.

@@ -59,6 +59,8 @@ ordered_json ApplyJson::toJson() const
         json["change"] = {{"files", m_facts.changeNames},
                           {"invalid", changes.countInvalid()},
                           {"unread", app::toJson(m_facts.changeUnread)}};
+    if (m_facts.settings)
+        json["settings"] = m_facts.settings->toJson();
     json["runNeeded"] = m_facts.isRunNeeded;
     json["applied"] = m_facts.appliedCount;
     json["passedOver"] = std::move(passedOver);
@@ -70,6 +72,7 @@ ordered_json ApplyJson::toJson() const
     json["tracks"] = std::move(tracks);
     json["markers"] = std::move(markers);
     json["written"] = m_facts.written.empty() ? ordered_json() : ordered_json(m_facts.written);
+    json["backup"] = m_facts.backups.empty() ? ordered_json() : ordered_json(m_facts.backups.front());
     return json;
 }
 

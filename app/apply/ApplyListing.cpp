@@ -5,9 +5,10 @@
 #include "app/console/Columns.h"
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
-#include "app/settings/SettingsTable.h"
+#include "app/edl/ScreenTimecode.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
+#include "core/time/Timecode.h"
 
 #include <algorithm>
 #include <array>
@@ -136,7 +137,9 @@ std::string eventText(const core::EventBase& event)
 {
     std::array<char, 8> number{};
     std::snprintf(number.data(), number.size(), "%03u", event.eventNumber());
-    return std::string(number.data()) + "  " + event.dstIn().toString() + "  " + event.dstOut().toString() + "  " +
+    const core::Framerate framerate = core::Timecode::framerate();
+    return std::string(number.data()) + "  " + onScreen(event.dstIn().toString(), framerate) + "  " +
+           onScreen(event.dstOut().toString(), framerate) + "  " +
            toPrintable(event.rollName(), MostCharactersOfAName).text;
 }
 
@@ -153,15 +156,15 @@ void ApplyListing::printTotals(std::ostream& out) const
         out << "Frame rate  " << rate << '\n'
             << "Change EDL  " << describeEvents(model.changeEdl(), m_facts.changeNames, countOf(m_facts.changeUnread))
             << '\n';
-    const auto timeText = [this](double seconds) { return m_clock.exactTimecode(seconds - m_facts.timeOrigin); };
-    const std::vector<std::string> settings = unusualSettings(model.settings(), timeText);
-    if (!settings.empty())
-        out << "Settings    " << joined(settings) << '\n';
+    if (m_facts.settings)
+        out << m_facts.settings->text("Settings    ");
     if (!m_facts.matchText.empty())
         out << "Match       " << m_facts.matchText << '\n';
     if (m_facts.isRunNeeded)
         out << "Applied     " << counted(m_facts.appliedCount, "event") << " in " << secondsText(m_facts.seconds)
             << '\n';
+    else if (m_facts.isHeldBack)
+        out << "Applied     nothing, since all that would change lies outside of the stretch that may change\n";
     else
         out << "Applied     nothing, since no track has to change\n";
     printPassedOver(out);
@@ -182,10 +185,11 @@ void ApplyListing::printPassedOver(std::ostream& out) const
 
 void ApplyListing::printLost(std::ostream& out) const
 {
-    const auto timeText = [this](double seconds) { return m_clock.timecode(seconds - m_facts.timeOrigin); };
+    const auto timeText = [this](double seconds) { return m_clock.exactTimecode(seconds - m_facts.timeOrigin); };
     const char* title = "Lost        ";
+    const char* const why = m_facts.generation ? ", for want of room\n" : ", which the change EDL carries nowhere\n";
     for (const core::SecondsRange& range : m_facts.lost) {
-        out << title << timeText(range.start) << " - " << timeText(range.end) << ", for want of room\n";
+        out << title << timeText(range.start) << " - " << timeText(range.end) << why;
         title = "            ";
     }
 }
@@ -215,6 +219,8 @@ void ApplyListing::printWritten(std::ostream& out) const
     if (m_facts.written.empty())
         written.emplace_back("no project; give -o PROJECT.stage or --in-place");
     out << "Written     " << joined(written) << '\n';
+    for (const std::string& backup : m_facts.backups)
+        out << "Backup      " << toPrintable(backup).text << '\n';
 }
 
 void ApplyListing::printTrackTotals(std::ostream& out) const

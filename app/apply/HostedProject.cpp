@@ -5,19 +5,25 @@
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
 #include "app/console/Terminal.h"
+#include "app/console/Wording.h"
 #include "app/project/ProjectAccess.h"
+#include "app/project/ProjectContent.h"
+#include "app/project/StoredModel.h"
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextListenerInterface.h"
 #include "host/Host.h"
+#include "standin/base/Times.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 #include "util/Result.h"
+#include "velmark/Attributes.h"
 
 #include <iostream>
 #include <optional>
 
 namespace cadrel::app {
 
+using standin::ProjectFileChanged;
 using standin::ProjectFileError;
 using util::Result;
 
@@ -42,6 +48,31 @@ Failure breakFailure(std::optional<Result::Type> result, const std::string& file
     if (!result)
         return {file, "the run didn't begin", "report it with the files"};
     return {file, "the run broke off before its end: failure " + std::to_string(*result), "report it with the files"};
+}
+
+/// A run works in a stretch that begins after all content and is as long as the content. Beyond this time of the project there
+/// may be no room for it.
+constexpr double FurthestContent = standin::FurthestTime / 2 - 2 * 86400.0;
+
+/// What stands too far for a run, in words: "the clip "hello" on the track "DIA 1" stands at 271752:00:00:00". Nothing where
+/// all is near enough. Automation doesn't count: it can stand after the end of a project.
+std::optional<std::string> farContent(const standin::Project& project, const ProjectClock& clock)
+{
+    double furthest = FurthestContent;
+    std::optional<std::string> words;
+    for (const standin::Track* const track : tracksOf(project)) {
+        const auto visit = [&](const PlacedEvent& placed) {
+            if (placed.end <= furthest)
+                return;
+            furthest = placed.end;
+            words = std::string("the ") + kindOf(placed.event) + " " + quoted(printableName(placed.event.name())) +
+                    " on the track " + quoted(printableName(track->name())) + " stands at " +
+                    clock.exactTimecode(placed.start);
+        };
+        if (!track->isFolder())
+            visitAllEvents(*track, 0.0, 0, visit);
+    }
+    return words;
 }
 
 /// Hears how the run of a host ends.
@@ -69,9 +100,10 @@ private:
 
 } // namespace
 
-HostedProject::HostedProject(const std::string& file, const Terminal& terminal)
-    : m_file(file), m_application(standin::Terminal(std::cerr, terminal.showsProgress(), Interruption::request())),
-      m_host(Velmark::makeCounted<host::Host>(m_application.context()))
+HostedProject::HostedProject(const std::string& file, const Terminal& terminal, Opening opening)
+    : m_file(file), m_stamp(util::FileStamp::of(file)),
+      m_application(
+          standin::Terminal(std::cerr, terminal.showsProgress(), Interruption::request(), Terminal::lineLength()))
 {
     requireReadableProject(file);
     try {
@@ -79,7 +111,23 @@ HostedProject::HostedProject(const std::string& file, const Terminal& terminal)
     } catch (const ProjectFileError& error) {
         throw readingFailure(error, file);
     }
+    // Before Cadrel meets the project: it would tell of the model in an alert, and go on without.
+    dropUnreadableModel(opening);
+    m_host = Velmark::makeCounted<host::Host>(m_application.context());
     m_application.activateProject(m_project);
+}
+
+void HostedProject::dropUnreadableModel(Opening opening)
+{
+    const StoredModel stored(*m_project, clockOf(*m_project, m_file));
+    if (!stored.isUnreadable())
+        return;
+    if (opening == Opening::WithStored)
+        throw Failure{m_file, stored.fault(), stored.remedy()};
+    if (opening == Opening::FreshInPlace && stored.isOfNewerVersion())
+        throw Failure{m_file, stored.fault() + ", and is kept", "give -o to write the project elsewhere"};
+    for (const char* const key : {Velmark::AttributeKey::Storage, Velmark::AttributeKey::StorageChecksum})
+        m_project->removeAttribute(key);
 }
 
 HostedProject::~HostedProject() = default;
@@ -97,20 +145,26 @@ void HostedProject::endPreview()
 
 void HostedProject::apply()
 {
+    // What a run that breaks off leaves would be further off.
+    const std::optional<std::string> far = farContent(*m_project, clockOf(*m_project, m_file));
     const Result::Type result = m_host->startCadrel();
     if (result != Result::Ok)
         throw startFailure(result, m_file);
     const RunEnd end(*m_host);
     m_application.idle();
     Interruption::check();
+    if (end.result() == Result::HostCallFailed && far)
+        throw Failure{m_file, *far + ", too far off for a run", "move it to its place, or remove it"};
     if (end.result() != Result::Ok)
         throw breakFailure(end.result(), m_file);
 }
 
-void HostedProject::save(const std::string& file)
+void HostedProject::save(const std::string& file, const std::optional<util::FileStamp>& expected)
 {
     try {
-        m_application.saveProject(*m_project, file);
+        m_application.saveProject(*m_project, file, expected);
+    } catch (const ProjectFileChanged& error) {
+        throw changedFailure(error, file);
     } catch (const ProjectFileError& error) {
         throw writingFailure(error, file);
     }

@@ -3,8 +3,10 @@
 #pragma once
 
 #include "standin/Application.h"
+#include "util/FileStamp.h"
 #include "velmark/Counted.h"
 
+#include <optional>
 #include <string>
 
 namespace cadrel::core {
@@ -23,8 +25,15 @@ class Terminal;
 /// told of the project. A run is requested as the window requests it, and done in the host's next idle call.
 class HostedProject {
 public:
-    /// Throws Failure when the file can't be read. The terminal shows the progress of a run.
-    HostedProject(const std::string& file, const Terminal& terminal);
+    /// What becomes of a stored model that can't be read.
+    enum class Opening {
+        WithStored,   ///< it is a failure
+        Fresh,        ///< it is dropped
+        FreshInPlace, ///< it is dropped, but for that of a newer version, which is a failure
+    };
+
+    /// Throws Failure when the file or its model can't be read. The terminal shows the progress of a run.
+    HostedProject(const std::string& file, const Terminal& terminal, Opening opening);
     HostedProject(const HostedProject&) = delete;
     HostedProject& operator=(const HostedProject&) = delete;
     ~HostedProject();
@@ -38,11 +47,21 @@ public:
     /// Interruption::Requested then, and Failure when the run couldn't begin or failed.
     void apply();
 
-    /// The host's own save, in which the model is stored with the project. Throws Failure.
-    void save(const std::string& file);
+    // The host's own save, in which the model is stored with the project. Each throws Failure, with all files as they were.
+
+    /// Over the file that was read. Refused when another program has saved it since.
+    void saveInPlace() { save(m_file, m_stamp); }
+    /// To a file that doesn't exist. Refused when it does by now.
+    void saveAs(const std::string& file) { save(file, util::FileStamp()); }
+    /// Over whatever stands there.
+    void saveOver(const std::string& file) { save(file, std::nullopt); }
 
 private:
+    void dropUnreadableModel(Opening opening);
+    void save(const std::string& file, const std::optional<util::FileStamp>& expected);
+
     std::string m_file;
+    util::FileStamp m_stamp; ///< of the file, before it was read
     standin::Application m_application;
     Velmark::Counted<host::Host> m_host;
     standin::Project* m_project = nullptr;

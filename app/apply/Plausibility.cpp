@@ -6,8 +6,9 @@
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
 #include "core/edl/EventBase.h"
+#include "core/edl/ProgrammePlace.h"
 #include "core/keep/Material.h"
-#include "core/keep/PictureComparison.h"
+#include "core/keep/PastRuns.h"
 #include "core/keep/PictureLine.h"
 #include "core/keep/PictureNames.h"
 #include "core/model/DataModel.h"
@@ -30,7 +31,7 @@ using core::FrameRange;
 using core::FrameRanges;
 using core::Framerate;
 using core::MatchBy;
-using core::PictureComparison;
+using core::PastRuns;
 using core::PictureLine;
 using core::PictureNames;
 using core::Settings;
@@ -82,8 +83,7 @@ void countNames(const EventList& events, const Settings& settings, NameCount& co
     versions.compileEnabled(settings.vfxPatterns());
     for (const auto& event : events.events()) {
         const std::string& name = settings.matchBy() == MatchBy::ClipName ? event->clipName() : event->rollName();
-        const bool isBlack = event->rollName() == "BL" || event->rollName() == "BLACK";
-        if (!isBlack && !event->hasFlaw(EventFlaw::NotVideoEvent))
+        if (!isBlack(*event) && !event->hasFlaw(EventFlaw::NotVideoEvent))
             ++count[versions.stripVersion(name)];
     }
 }
@@ -101,26 +101,28 @@ Plausibility::Plausibility(const DataModel& model, const std::string& projectFil
 {
 }
 
-std::optional<Failure> Plausibility::doubtOfLastCut(const EventList& lastCut) const
+std::optional<Failure> Plausibility::doubtOfLastCut(const PastRuns& runs) const
 {
-    const Settings& settings = m_model.settings();
-    PictureNames names(settings.matchBy(), settings.vfxPatterns());
-    const PictureLine last(lastCut, names, m_framerate);
     // A project doesn't store which shots are reversed.
     EventList oldCut;
     oldCut.copyFrom(m_model.oldEdl());
     for (const auto& event : oldCut.events())
         event->setReversed(false);
-    const PictureLine given(oldCut, names, m_framerate);
-    const FrameRange day{0, m_framerate.lastFrame + 1};
-    const FrameRanges different =
-        intersect(PictureComparison(last, given).differencesUnder(0, day), intersect(last.lit(), given.lit()));
-    if (different.empty())
+    const std::optional<std::int32_t> difference = runs.firstDifference(oldCut);
+    if (!difference)
         return std::nullopt;
     return Failure{m_projectFile,
                    "was last carried over to another cut than the old one given; they differ first at " +
-                       timecodeOf(different.front().start, m_framerate),
+                       timecodeOf(*difference, m_framerate),
                    "give that cut with --old, take the project as it was before, or give --force"};
+}
+
+std::optional<Failure> Plausibility::doubtOfChanges(const PastRuns& runs, bool isGiven) const
+{
+    if (!runs.haveCarriedOut(m_model.changeEdl(), isGiven))
+        return std::nullopt;
+    return Failure{m_inputs, "this change has been carried out in the project already",
+                   "take the project as it was before, or give --force"};
 }
 
 std::optional<Failure> Plausibility::doubtOfNames() const

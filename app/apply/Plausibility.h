@@ -3,7 +3,6 @@
 #pragma once
 
 #include "app/console/Failure.h"
-#include "core/edl/EventList.h"
 #include "core/keep/FrameRange.h"
 #include "core/time/Framerate.h"
 
@@ -12,6 +11,7 @@
 
 namespace cadrel::core {
 class DataModel;
+class PastRuns;
 } // namespace cadrel::core
 
 namespace standin {
@@ -27,9 +27,10 @@ public:
     /// The model holds both cuts; all outlive this. `inputs` names the EDLs.
     Plausibility(const core::DataModel& model, const std::string& projectFile, const std::string& inputs);
 
-    /// Whether the project was last carried over to another cut than the old one, as far as both have picture at the same
-    /// time.
-    std::optional<Failure> doubtOfLastCut(const core::EventList& lastCut) const;
+    /// Whether the sound stands in another cut than the old one given, as far as both have a reel at the same time.
+    std::optional<Failure> doubtOfLastCut(const core::PastRuns& runs) const;
+    /// Whether the change EDL of the model has been carried out already; `isGiven` for one that isn't made of two cuts.
+    std::optional<Failure> doubtOfChanges(const core::PastRuns& runs, bool isGiven) const;
     /// Whether the two cuts have no name in common.
     std::optional<Failure> doubtOfNames() const;
     /// Whether less than half of the old cut has any sound.

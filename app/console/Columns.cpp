@@ -2,21 +2,11 @@
 
 #include "app/console/Columns.h"
 
+#include "app/console/Printable.h"
+
 #include <algorithm>
-#include <string_view>
 
 namespace cadrel::app {
-
-namespace {
-
-/// In characters.
-std::size_t widthOf(std::string_view utf8)
-{
-    return static_cast<std::size_t>(std::count_if(
-        utf8.begin(), utf8.end(), [](char byte) { return (static_cast<unsigned char>(byte) & 0xc0U) != 0x80U; }));
-}
-
-} // namespace
 
 Columns::Columns(const Row& titles, const std::vector<std::size_t>& rightAligned)
     : m_titles(titles), m_columns(titles.size())
@@ -29,14 +19,14 @@ Columns::Columns(const Row& titles, const std::vector<std::size_t>& rightAligned
 void Columns::measure(const Row& row)
 {
     for (std::size_t index = 0; index < m_columns.size(); ++index)
-        m_columns[index].width = std::max(m_columns[index].width, widthOf(row[index]));
+        m_columns[index].width = std::max(m_columns[index].width, displayWidth(row[index]));
 }
 
 std::string Columns::lineOf(const Row& row) const
 {
     std::string line;
     for (std::size_t index = 0; index < m_columns.size(); ++index) {
-        const std::size_t width = widthOf(row[index]);
+        const std::size_t width = displayWidth(row[index]);
         const std::string fill(std::max(m_columns[index].width, width) - width, ' ');
         line += index == 0 ? "" : "  ";
         line += m_columns[index].alignsRight ? fill + row[index] : row[index] + fill;

@@ -3,9 +3,12 @@
 #include "app/console/Paths.h"
 
 #include "app/console/Printable.h"
+#include "util/FilePath.h"
+#include "util/Result.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <filesystem>
 #include <optional>
 #include <system_error>
@@ -19,6 +22,20 @@ namespace {
 
 /// Bytes, on the file systems in use.
 constexpr std::size_t LongestName = 255;
+
+/// Bytes. The list of a feature film has a hundredth of it.
+constexpr std::uintmax_t LargestEdl = std::uintmax_t{256} * 1024 * 1024;
+
+/// Where a file would be written, in one form for all its names. Empty where that isn't known.
+fs::path placeOf(const std::string& file)
+{
+    try {
+        std::error_code error;
+        return fs::weakly_canonical(fs::absolute(util::followLinks(file), error), error);
+    } catch (const util::Result::Type&) {
+        return {};
+    }
+}
 
 } // namespace
 
@@ -43,9 +60,8 @@ bool isSameFile(const std::string& a, const std::string& b)
         return fs::is_regular_file(a, error) && fs::equivalent(a, b, error);
     if (aExists || bExists)
         return false;
-    const fs::path fullA = fs::weakly_canonical(fs::absolute(a, error), error);
-    const fs::path fullB = fs::weakly_canonical(fs::absolute(b, error), error);
-    return !fullA.empty() && fullA == fullB;
+    const fs::path placeOfA = placeOf(a);
+    return !placeOfA.empty() && placeOfA == placeOf(b);
 }
 
 void refuseToOverwrite(const std::vector<std::string>& files, const std::string& output)
@@ -53,6 +69,16 @@ void refuseToOverwrite(const std::vector<std::string>& files, const std::string&
     const auto same = [&output](const std::string& file) { return isSameFile(file, output); };
     if (std::any_of(files.begin(), files.end(), same))
         throw UsageError{output + ": writing it would overwrite another file of this run", "give another name"};
+}
+
+void requireEdlSize(const std::string& path)
+{
+    std::error_code error;
+    if (!fs::is_regular_file(path, error))
+        return;
+    const std::uintmax_t size = fs::file_size(path, error);
+    if (!error && size > LargestEdl)
+        throw Failure{path, "is larger than 256 MB, which no EDL is", "give the CMX EDL of a picture track"};
 }
 
 Failure unreadable(const std::string& path, FileKind kind)

@@ -4,14 +4,19 @@
 
 #include "app/console/Printable.h"
 
+#include <algorithm>
 #include <cstdlib>
 #include <iostream>
 #include <string_view>
+#include <sys/ioctl.h>
 #include <unistd.h>
 
 namespace cadrel::app {
 
 namespace {
+
+/// Where the width of the terminal isn't known, and on a wider one.
+constexpr std::size_t LongestLine = 79;
 
 std::string sentence(const Failure& failure)
 {
@@ -33,11 +38,18 @@ Terminal::~Terminal()
     clearProgress();
 }
 
+std::size_t Terminal::lineLength()
+{
+    winsize size{};
+    const bool isKnown = ioctl(STDERR_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_col > 1;
+    return isKnown ? std::min<std::size_t>(size.ws_col - 1U, LongestLine) : LongestLine;
+}
+
 void Terminal::showProgress(const std::string& what)
 {
     if (m_showsProgress) {
         clearProgress();
-        std::cerr << toPrintable(what, 70).text << std::flush;
+        std::cerr << toPrintable(what, lineLength()).text << std::flush;
         m_progressShown = true;
     }
 }

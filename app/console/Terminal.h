@@ -4,6 +4,7 @@
 
 #include "app/console/Failure.h"
 
+#include <cstddef>
 #include <set>
 #include <string>
 
@@ -19,6 +20,8 @@ public:
 
     /// Whether standard error is a terminal.
     bool showsProgress() const { return m_showsProgress; }
+    /// How many columns of it a line may take without wrapping.
+    static std::size_t lineLength();
     /// Shows what is being done, on a terminal only.
     void showProgress(const std::string& what);
     void clearProgress();

@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/HealedEvent.h"
+#include "core/edl/ProgrammePlace.h"
 
 #include <algorithm>
 #include <iterator>
@@ -12,7 +13,6 @@
 namespace cadrel::app {
 
 using core::EventBase;
-using core::EventFlaw;
 using core::EventList;
 using core::Framerate;
 using core::HealedEvent;
@@ -29,14 +29,6 @@ struct Stretch {
 bool startsEarlier(const Stretch& a, const Stretch& b)
 {
     return a.start < b.start;
-}
-
-/// Whether an event fills a part of the programme.
-bool fillsProgramme(const EventBase& event, const Framerate& framerate)
-{
-    const bool hasTimes = event.dstIn().isInitialized() && event.dstOut().isInitialized() &&
-                          event.dstIn().isValid(framerate) && event.dstOut().isValid(framerate);
-    return hasTimes && event.dstIn() < event.dstOut() && !event.hasFlaw(EventFlaw::NotVideoEvent);
 }
 
 void addStretches(const EventList& events, const Framerate& framerate, std::vector<Stretch>& stretches)

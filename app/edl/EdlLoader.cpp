@@ -73,6 +73,7 @@ Framerate EdlLoader::chooseRate(const std::string& firstFile) const
         return ProjectFramerate::fromLabel(m_options.rateLabel);
     Framerate shown;
     const std::wstring path = toWide(firstFile);
+    requireEdlSize(firstFile);
     const auto parser = parserFor(path);
     parser->readThoroughly();
     if (parser->detect(path, shown) != Result::Ok)
@@ -116,6 +117,7 @@ void EdlLoader::refuseUnreadable(const LoadedEdl& edl)
 void EdlLoader::load(LoadedEdl& edl) const
 {
     const std::wstring path = toWide(edl.path);
+    requireEdlSize(edl.path);
     m_terminal.showProgress("reading " + fileNameOf(edl.path));
     try {
         const auto parser = parserFor(path);

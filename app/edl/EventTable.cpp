@@ -3,6 +3,7 @@
 #include "app/edl/EventTable.h"
 
 #include "app/console/Printable.h"
+#include "app/edl/ScreenTimecode.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
@@ -55,7 +56,7 @@ std::string transitionOf(const EventBase& event)
 
 std::string timecodeOf(const Timecode& timecode)
 {
-    return timecode.isInitialized() ? timecode.toString() : "--:--:--:--";
+    return timecode.isInitialized() ? onScreen(timecode.toString(), Timecode::framerate()) : "--:--:--:--";
 }
 
 std::string speedOf(const EventBase& event)

@@ -104,8 +104,7 @@ std::string remedyFor(const LoadedEdl& edl, const std::optional<std::int32_t>& h
 {
     if (!hours)
         return "give files of different timecodes";
-    return "give --shift " + fileNameOf(edl.path) + "=" + (*hours < 0 ? "-" : "+") +
-           Timecode(std::abs(*hours), 0, 0, 0).toString();
+    return "give --shift " + edl.path + "=" + (*hours < 0 ? "-" : "+") + Timecode(std::abs(*hours), 0, 0, 0).toString();
 }
 
 } // namespace

@@ -4,7 +4,7 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Printable.h"
 #include "app/console/Terminal.h"
@@ -18,10 +18,13 @@
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
+#include <algorithm>
 #include <cstddef>
+#include <filesystem>
 #include <iostream>
 #include <optional>
 #include <string_view>
+#include <system_error>
 
 namespace cadrel::app {
 
@@ -33,13 +36,15 @@ using nlohmann::ordered_json;
 using util::Result;
 using util::StringUtil;
 
+namespace fs = std::filesystem;
+
 namespace {
 
 /// Throws UsageError when one of the change EDL's files, or the JSON file, would overwrite another file of this run.
 void checkOutputs(const GenerateOptions& options, const std::vector<std::string>& changeFiles)
 {
     std::vector<std::string> taken = inputsOf(options.generation);
-    if (JsonOutput::isFile(options.jsonFile)) {
+    if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite(taken, options.jsonFile);
         taken.push_back(options.jsonFile);
     }
@@ -68,12 +73,72 @@ void saveChangeEdl(const EventList& changeEvents, const std::string& path, const
         throw unwritable(files);
 }
 
-std::string writtenText(const GenerateOptions& options, std::vector<std::string> written)
+/// "001" has the number 1, but isn't how a part is numbered.
+bool isPartNumber(std::string_view text)
 {
-    if (JsonOutput::isFile(options.jsonFile))
+    return !text.empty() && text.front() != '0' &&
+           std::all_of(text.begin(), text.end(), [](char digit) { return digit >= '0' && digit <= '9'; });
+}
+
+/// The files of an earlier list of that name that aren't of this run: parts with higher numbers, or all of them beside a list
+/// in one file, and the one file beside a list in parts. `used` is what this run reads and writes.
+std::vector<std::string> leftOver(const std::string& path, const std::vector<std::string>& used)
+{
+    if (path.empty())
+        return {};
+    const fs::path file(path);
+    const std::string start = file.stem().string() + "_";
+    const std::string end = file.extension().string();
+    const auto isPart = [&](const std::string& name) {
+        return name.size() > start.size() + end.size() && name.starts_with(start) && name.ends_with(end) &&
+               isPartNumber(std::string_view(name).substr(start.size(), name.size() - start.size() - end.size()));
+    };
+    std::error_code error;
+    std::vector<std::string> found;
+    const fs::path folder = file.has_parent_path() ? file.parent_path() : fs::path(".");
+    for (fs::directory_iterator entry(folder, error), none; !error && entry != none; entry.increment(error)) {
+        const std::string name = entry->path().filename();
+        const std::string candidate = file.parent_path() / name;
+        const auto isCandidate = [&](const std::string& other) { return isSameFile(other, candidate); };
+        if ((isPart(name) || name == file.filename()) && std::none_of(used.begin(), used.end(), isCandidate))
+            found.push_back(candidate);
+    }
+    // By their numbers.
+    std::sort(found.begin(), found.end(), [](const std::string& a, const std::string& b) {
+        return a.size() != b.size() ? a.size() < b.size() : a < b;
+    });
+    return found;
+}
+
+/// The files of a run.
+struct Files {
+    std::vector<std::string> change;
+    std::vector<std::string> backups;
+    std::vector<std::string> leftOver;
+};
+
+std::string writtenText(const GenerateOptions& options, const Files& files)
+{
+    std::vector<std::string> written = files.change;
+    if (Output::isFile(options.jsonFile))
         written.push_back(options.jsonFile);
-    return "Written     " + (written.empty() ? "nothing; give -o CHANGE.edl" : toPrintable(joined(written)).text) +
-           "\n";
+    const auto line = [](const char* title, const std::vector<std::string>& names, const char* remark) {
+        return names.empty() ? std::string() : title + toPrintable(joined(names)).text + remark + "\n";
+    };
+    return (written.empty() ? "Written     nothing; give -o CHANGE.edl\n" : line("Written     ", written, "")) +
+           line("Backup      ", files.backups, "") +
+           line("Left over   ", files.leftOver, ", of an earlier list; remove what you don't need");
+}
+
+void writeJson(Output& output, const DataModel& model, const GenerationReport& report, const std::string& rate,
+               const Files& files)
+{
+    ordered_json facts{{"rate", rate}};
+    facts.update(report.toJson());
+    facts["written"] = files.change;
+    facts["backups"] = files.backups;
+    facts["leftOver"] = files.leftOver;
+    EventJson::write(model.changeEdl().events(), facts, [&](std::string_view text) { output.write(text); });
 }
 
 } // namespace
@@ -93,34 +158,43 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     const Cuts cuts = generateChangeEdl(model, options.generation, terminal);
     requireChangeEvents(model, options.generation);
     const GenerationReport report(model, model.changeEdl(), cuts, framerate.getFramerate());
-    const std::vector<std::string> changeFiles = filesOf(options.changeFile, model.changeEdl().size());
-    checkOutputs(options, changeFiles);
+    Files files{filesOf(options.changeFile, model.changeEdl().size()), {}, {}};
+    checkOutputs(options, files.change);
+    requireReplaceable(files.change, options.replacing);
 
     terminal.showProgress("writing");
     std::optional<Interruption> interruption;
-    if (!changeFiles.empty() || JsonOutput::isFile(options.jsonFile))
+    if (!files.change.empty() || Output::isFile(options.jsonFile))
         interruption.emplace();
-    std::optional<JsonOutput> json;
-    if (!options.jsonFile.empty()) {
-        ordered_json facts{{"rate", rate}};
-        facts.update(report.toJson());
-        facts["written"] = changeFiles;
+    Backups backups(options.replacing.keepsFormer ? files.change : std::vector<std::string>());
+    files.backups = backups.names();
+    std::vector<std::string> used = inputsOf(options.generation);
+    used.insert(used.end(), files.change.begin(), files.change.end());
+    files.leftOver = leftOver(options.changeFile, used);
+    std::optional<Output> json;
+    if (Output::isFile(options.jsonFile)) {
         json.emplace(options.jsonFile);
-        EventJson::write(model.changeEdl().events(), facts, [&](std::string_view text) { json->write(text); });
+        writeJson(*json, model, report, rate, files);
         json->finish();
     }
     if (!options.changeFile.empty())
-        saveChangeEdl(model.changeEdl(), options.changeFile, changeFiles);
+        saveChangeEdl(model.changeEdl(), options.changeFile, files.change);
+    backups.keep();
     if (json)
-        json->keep();
+        json->place();
+    interruption.reset();
 
     terminal.clearProgress();
-    if (!JsonOutput::isStandardOutput(options.jsonFile)) {
-        const char* const origin = options.generation.load.rateLabel.empty() ? ", as the old cut shows" : "";
-        std::cout << report.cutsText(rate + origin) << report.changeText() << report.insertsText()
-                  << writtenText(options, changeFiles);
-        flushStandardOutput();
+    if (Output::isStandardOutput(options.jsonFile)) {
+        Output output(options.jsonFile);
+        writeJson(output, model, report, rate, files);
+        output.place();
+        return;
     }
+    const char* const origin = options.generation.load.rateLabel.empty() ? ", as the old cut shows" : "";
+    std::cout << report.cutsText(rate + origin) << report.changeText() << report.insertsText()
+              << writtenText(options, files);
+    flushStandardOutput();
 }
 
 } // namespace cadrel::app

@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "app/console/Replacing.h"
 #include "app/edl/Generation.h"
 
 #include <string>
@@ -13,11 +14,12 @@ class Terminal;
 struct GenerateOptions {
     GenerationOptions generation;
     std::string changeFile; ///< empty: none is written
-    std::string jsonFile;   ///< empty: none is written; "-": standard output
+    Replacing replacing;
+    std::string jsonFile; ///< empty: none is written; "-": standard output
 };
 
-/// `cadrel generate`: makes the change EDL of two cuts, and a summary. The files appear together when all has gone
-/// well, or not at all. Throws Failure and UsageError.
+/// `cadrel generate`: makes the change EDL of two cuts, and a summary. The JSON is prepared before the change EDL is written,
+/// and takes its place after it. Throws Failure and UsageError.
 void runGenerate(const GenerateOptions& options, Terminal& terminal);
 
 } // namespace cadrel::app

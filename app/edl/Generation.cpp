@@ -150,15 +150,17 @@ std::vector<std::string> inputsOf(const GenerationOptions& options)
 
 void configure(Settings& settings, const GivenSettings& given)
 {
-    for (const auto& change : given.changes)
-        change(settings);
-    if (given.vfxPatterns.empty())
+    for (const GivenSettings::Change& change : given.changes)
+        change.apply(settings);
+    std::vector<std::string> patterns = given.vfxPatterns;
+    if (patterns.empty())
         return;
-    if (given.vfxPatterns.size() > Settings::VfxRowCount)
+    if (std::erase(patterns, NoVfxPatterns) > 0 && !patterns.empty())
+        throw UsageError{std::string("--vfx: give ") + NoVfxPatterns + " alone"};
+    if (patterns.size() > Settings::VfxRowCount)
         throw UsageError{"--vfx: can be given " + std::to_string(Settings::VfxRowCount) + " times at most"};
     for (std::size_t row = 0; row < Settings::VfxRowCount; ++row)
-        settings.setVfxPattern(
-            row < given.vfxPatterns.size() ? vfxPatternOf(given.vfxPatterns[row]) : VfxPatternEntry(), row);
+        settings.setVfxPattern(row < patterns.size() ? vfxPatternOf(patterns[row]) : VfxPatternEntry(), row);
 }
 
 namespace {

@@ -4,12 +4,14 @@
 
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
+#include "app/edl/ScreenTimecode.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/HealedEvent.h"
 #include "core/model/DataModel.h"
 #include "core/time/Timecode.h"
 
 #include <algorithm>
+#include <unordered_set>
 #include <utility>
 
 namespace cadrel::app {
@@ -23,13 +25,13 @@ using nlohmann::ordered_json;
 
 namespace {
 
+/// What was read, and what couldn't be.
 ordered_json sideToJson(const EventList& events, const std::vector<std::string>& names,
                         const std::vector<UnreadOfFile>& unread)
 {
-    return {{"files", names},
-            {"events", events.size()},
-            {"invalid", events.countInvalid()},
-            {"unread", app::toJson(unread)}};
+    ordered_json side = describeEventsAsJson(events, names);
+    side["unread"] = app::toJson(unread);
+    return side;
 }
 
 /// "93.6".
@@ -45,10 +47,28 @@ std::string describeEvents(const EventList& events, const std::vector<std::strin
 {
     const std::size_t invalid = events.countInvalid();
     const auto reversed = std::ranges::count_if(events.events(), [](const auto& event) { return event->isReversed(); });
-    return toPrintable(joined(names)).text + ": " + counted(events.size(), "event") + ", " +
+    const std::string title = names.empty() ? "" : toPrintable(joined(names)).text + ": ";
+    return title + counted(events.size(), "event") + ", " +
            (invalid == 0 ? "all valid" : std::to_string(invalid) + " invalid") +
            (reversed == 0 ? "" : ", " + std::to_string(reversed) + " reversed") +
            (unreadLines == 0 ? "" : ", " + counted(unreadLines, "line") + " not read");
+}
+
+ordered_json describeEventsAsJson(const EventList& events, const std::vector<std::string>& names)
+{
+    return {{"files", names}, {"events", events.size()}, {"invalid", events.countInvalid()}};
+}
+
+std::vector<std::string> edlFilesOf(const EventList& events)
+{
+    std::vector<std::string> files;
+    std::unordered_set<std::string> known;
+    for (const auto& event : events.events()) {
+        // What was generated wasn't read from any.
+        if (!event->edlFileName().empty() && known.insert(event->edlFileName()).second)
+            files.push_back(event->edlFileName());
+    }
+    return files;
 }
 
 GenerationReport::GenerationReport(const DataModel& model, const EventList& carried, Cuts cuts,
@@ -76,7 +96,7 @@ std::string GenerationReport::changeText() const
     if (m_healedEvents > 0)
         healed = ", " + std::to_string(m_healedEvents) + " of them healed from " + std::to_string(m_healedMembers);
     return "Change EDL  " + counted(m_model.changeEdl().size(), "event") + healed + "\n" + //
-           "Covered     " + timecode(m_coverage.coveredFrames) + " of " + timecode(m_coverage.programmeFrames) + ", " +
+           "Covered     " + shown(m_coverage.coveredFrames) + " of " + shown(m_coverage.programmeFrames) + ", " +
            percentOf(m_coverage) + " %\n";
 }
 
@@ -85,11 +105,11 @@ std::string GenerationReport::insertsText() const
     if (m_coverage.inserts.empty())
         return "Inserts     none\n";
     std::string text = "Inserts     " + std::to_string(m_coverage.inserts.size()) + ", together " +
-                       timecode(m_coverage.insertedFrames()) + "\n\n" +
+                       shown(m_coverage.insertedFrames()) + "\n\n" +
                        "            in           out          length       shot\n";
     for (const Insert& insert : m_coverage.inserts) {
-        text += "            " + timecode(insert.start) + "  " + timecode(insert.end) + "  " +
-                timecode(insert.frames()) + "  " + toPrintable(insert.shot, 40).text;
+        text += "            " + shown(insert.start) + "  " + shown(insert.end) + "  " + shown(insert.frames()) + "  " +
+                toPrintable(insert.shot, 40).text;
         text += insert.moreShots == 0 ? "\n" : " and " + std::to_string(insert.moreShots) + " more\n";
     }
     return text + "\n";
@@ -112,6 +132,11 @@ ordered_json GenerationReport::toJson() const
             {"programmeFrames", m_coverage.programmeFrames},
             {"coveredFrames", m_coverage.coveredFrames},
             {"inserts", std::move(inserts)}};
+}
+
+std::string GenerationReport::shown(std::int32_t frames) const
+{
+    return onScreen(timecode(frames), m_framerate);
 }
 
 std::string GenerationReport::timecode(std::int32_t frames) const

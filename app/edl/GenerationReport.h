@@ -37,6 +37,8 @@ public:
 
 private:
     std::string timecode(std::int32_t frames) const;
+    /// For people.
+    std::string shown(std::int32_t frames) const;
 
     const core::DataModel& m_model;
     Cuts m_cuts;
@@ -49,5 +51,10 @@ private:
 /// The names of EDL files and what is in them: "a.edl, b.edl: 12 events, all valid, 1 reversed, 2 lines not read".
 std::string describeEvents(const core::EventList& events, const std::vector<std::string>& names,
                            std::size_t unreadLines = 0);
+/// The same as {"files": [...], "events": ..., "invalid": ...}.
+nlohmann::ordered_json describeEventsAsJson(const core::EventList& events, const std::vector<std::string>& names);
+
+/// The files that the events were read from, in their order.
+std::vector<std::string> edlFilesOf(const core::EventList& events);
 
 } // namespace cadrel::app

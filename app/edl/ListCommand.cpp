@@ -4,13 +4,14 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
 #include "app/edl/EventJson.h"
 #include "app/edl/EventTable.h"
 #include "app/edl/ProjectFramerate.h"
+#include "app/edl/ScreenTimecode.h"
 #include "core/edl/EventBase.h"
 #include "core/time/Timecode.h"
 
@@ -77,9 +78,12 @@ std::string toText(const Totals& totals, const std::string& rate)
         (totals.reversed == 0 ? "" : ", " + std::to_string(totals.reversed) + " of them reversed") + "\n";
     if (totals.unreadLines > 0)
         text += "Not read    " + counted(totals.unreadLines, "line") + "\n";
+    const auto timecodeText = [](const Timecode& timecode) {
+        return onScreen(timecode.toString(), Timecode::framerate());
+    };
     if (totals.start)
-        text += "Programme   " + totals.start->toString() + " - " + totals.end->toString() + ", " +
-                (*totals.end - *totals.start).toString() + " long\n";
+        text += "Programme   " + timecodeText(*totals.start) + " - " + timecodeText(*totals.end) + ", " +
+                timecodeText(*totals.end - *totals.start) + " long\n";
     return text + "Frame rate  " + rate + "\n";
 }
 
@@ -100,20 +104,19 @@ void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const 
         unread.push_back({names.back(), edl.remarks.unreadLines});
     }
     std::optional<Interruption> interruption;
-    if (!JsonOutput::isStandardOutput(path))
+    if (!Output::isStandardOutput(path))
         interruption.emplace();
-    JsonOutput json(path);
+    Output json(path);
     EventJson::write(allEvents(edls), {{"files", names}, {"rate", rate}, {"unread", toJson(unread)}},
                      [&json](std::string_view text) { json.write(text); });
-    json.finish();
-    json.keep();
+    json.place();
 }
 
 } // namespace
 
 void runList(const ListOptions& options, Terminal& terminal)
 {
-    const bool jsonOnly = JsonOutput::isStandardOutput(options.jsonFile);
+    const bool jsonOnly = Output::isStandardOutput(options.jsonFile);
     if (!options.jsonFile.empty() && !jsonOnly)
         refuseToOverwrite(options.files, options.jsonFile);
     LoadOptions load = options.load;

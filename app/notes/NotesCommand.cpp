@@ -4,7 +4,7 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Terminal.h"
 #include "app/edl/ProjectFramerate.h"
@@ -63,8 +63,10 @@ core::PictureRules rulesFrom(const core::Settings& settings, const core::Framera
 void runNotes(const NotesOptions& options, Terminal& terminal)
 {
     const Writer writer = writerFor(options.outputFile);
-    if (!options.outputFile.empty())
+    if (!options.outputFile.empty()) {
         refuseToOverwrite(inputsOf(options.generation), options.outputFile);
+        requireReplaceable({options.outputFile}, options.replacing);
+    }
 
     // Taking long lists apart event by event takes a while; the end of the program does it at once.
     static DataModel& model = *new DataModel;
@@ -93,10 +95,11 @@ void runNotes(const NotesOptions& options, Terminal& terminal)
     if (!options.outputFile.empty())
         interruption.emplace();
     terminal.clearProgress();
-    JsonOutput output(options.outputFile.empty() ? "-" : options.outputFile);
+    Output output(options.outputFile.empty() ? "-" : options.outputFile);
     writer(document, [&output](std::string_view text) { output.write(text); });
-    output.finish();
-    output.keep();
+    Backups backups(options.replacing.keepsFormer ? std::vector{options.outputFile} : std::vector<std::string>());
+    output.place();
+    backups.keep();
 }
 
 } // namespace cadrel::app

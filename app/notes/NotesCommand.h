@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "app/console/Replacing.h"
 #include "app/edl/Generation.h"
 
 #include <cstdint>
@@ -14,6 +15,7 @@ class Terminal;
 struct NotesOptions {
     GenerationOptions generation;
     std::string outputFile; ///< its extension tells the form; empty: text on standard output
+    Replacing replacing;
     std::int32_t simplify = 0;
     bool showsFeet = false;
     bool isLetter = false; ///< the paper of a PDF is Letter, else A4

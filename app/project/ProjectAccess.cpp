@@ -47,6 +47,11 @@ Failure writingFailure(const ProjectFileError& error, const std::string& file)
     return fault == "can't be written" ? unwritable({file}) : Failure{file, fault, "correct the project"};
 }
 
+Failure changedFailure(const standin::ProjectFileChanged& error, const std::string& file)
+{
+    return {file, faultIn(error, file), "look at what it has written, and run again"};
+}
+
 ProjectClock clockOf(const standin::Project& project, const std::string& file)
 {
     try {
@@ -54,6 +59,12 @@ ProjectClock clockOf(const standin::Project& project, const std::string& file)
     } catch (const util::Result::Type&) {
         throw Failure{file, "has a frame rate at which no timecode counts", "correct the rate"};
     }
+}
+
+SettingsReport::TimeText timeText(const standin::Project& project, const ProjectClock& clock)
+{
+    // The settings count by the project's clock, and the clock from the start of the project.
+    return [&](double seconds) { return clock.exactTimecode(seconds - project.timeOrigin()); };
 }
 
 } // namespace cadrel::app

@@ -4,11 +4,13 @@
 
 #include "app/console/Failure.h"
 #include "app/project/ProjectClock.h"
+#include "app/settings/SettingsReport.h"
 
 #include <string>
 
 namespace standin {
 class Project;
+class ProjectFileChanged;
 class ProjectFileError;
 } // namespace standin
 
@@ -20,8 +22,12 @@ void requireReadableProject(const std::string& file);
 /// What an error in reading or writing a project file means for the user.
 Failure readingFailure(const standin::ProjectFileError& error, const std::string& file);
 Failure writingFailure(const standin::ProjectFileError& error, const std::string& file);
+Failure changedFailure(const standin::ProjectFileChanged& error, const std::string& file);
 
 /// Throws Failure for a project with a rate at which there is no timecode.
 ProjectClock clockOf(const standin::Project& project, const std::string& file);
+
+/// How a report writes the times of its settings. Both outlive it.
+SettingsReport::TimeText timeText(const standin::Project& project, const ProjectClock& clock);
 
 } // namespace cadrel::app

@@ -3,6 +3,7 @@
 #include "app/project/ProjectClock.h"
 
 #include "app/edl/ProjectFramerate.h"
+#include "app/edl/ScreenTimecode.h"
 #include "core/time/Timecode.h"
 #include "host/project/HostFramerate.h"
 
@@ -63,7 +64,7 @@ std::string ProjectClock::toExactText(double seconds) const
     const double subframes = std::floor(std::abs(seconds) * m_framerate.rate * SubframesOfAFrame + 0.5);
     const double frame = std::floor(subframes / SubframesOfAFrame);
     std::string text = signOf(std::copysign(subframes, seconds));
-    text += frameText(frame);
+    text += onScreen(frameText(frame), m_framerate);
     const int rest = static_cast<int>(subframes - frame * SubframesOfAFrame);
     if (rest != 0) {
         text += rest < 10 ? ".0" : ".";

@@ -20,11 +20,13 @@ public:
     /// The label of the rate, and in words what it stands for: "29.97 dfps (drop-frame, pulled down)".
     std::string rateInWords() const;
     std::string rateLabel() const;
+    const core::Framerate& framerate() const { return m_framerate; }
 
-    /// The timecode of a time of the project to the nearest frame, and for a length.
+    /// For programs: the timecode of a time of the project to the nearest frame, and for a length.
     std::string timecode(double seconds) const { return toText(m_origin + seconds); }
     std::string length(double seconds) const { return toText(seconds); }
-    /// With hundredths of a frame for a time that isn't on a frame: "03:00:07:12.25".
+    /// For people: with hundredths of a frame for a time that isn't on a frame, "03:00:07:12.25", and ";" before the frames of
+    /// a drop-frame rate.
     std::string exactTimecode(double seconds) const { return toExactText(m_origin + seconds); }
     std::string exactLength(double seconds) const { return toExactText(seconds); }
 

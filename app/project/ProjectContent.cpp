@@ -69,8 +69,9 @@ std::string printableName(const std::u16string& name, std::size_t mostCharacters
 {
     if (name.empty())
         return "(no name)";
-    // A character has two units at most, so that what isn't converted isn't shown either.
-    std::u16string_view start = std::u16string_view(name).substr(0, 2 * (mostCharacters + 1));
+    // What can't be shown isn't converted either: of a column, a letter and its accents have no more units.
+    constexpr std::size_t MostUnitsOfAColumn = 8;
+    std::u16string_view start = std::u16string_view(name).substr(0, MostUnitsOfAColumn * (mostCharacters + 1));
     const bool endsInHalf = start.back() >= 0xd800 && start.back() <= 0xdbff;
     start.remove_suffix(endsInHalf ? 1 : 0);
     return toPrintable(standin::toUtf8(start), mostCharacters).text;

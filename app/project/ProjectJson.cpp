@@ -2,6 +2,7 @@
 
 #include "app/project/ProjectJson.h"
 
+#include "app/edl/GenerationReport.h"
 #include "standin/base/AttributeList.h"
 #include "standin/base/Utf16.h"
 
@@ -65,9 +66,24 @@ const char* kindOf(const MediaClip& clip)
 
 } // namespace
 
-ProjectJson::ProjectJson(standin::Project& project, const ProjectClock& clock, Sink sink)
-    : m_project(project), m_clock(clock), m_sink(std::move(sink))
+ProjectJson::ProjectJson(standin::Project& project, const ProjectClock& clock, const StoredModel& stored, Sink sink)
+    : m_project(project), m_clock(clock), m_stored(stored), m_sink(std::move(sink))
 {
+}
+
+/// Null without one.
+ordered_json ProjectJson::lastRun() const
+{
+    if (m_stored.isUnreadable())
+        return {{"unreadable", m_stored.fault()}};
+    if (!m_stored.model())
+        return nullptr;
+    const core::DataModel& model = *m_stored.model();
+    const auto list = [](const core::EventList& events) { return describeEventsAsJson(events, edlFilesOf(events)); };
+    return {{"old", list(model.oldEdl())},
+            {"new", list(model.newEdl())},
+            {"change", list(model.changeEdl())},
+            {"settings", settingsIn(model, m_project, m_clock).toJson()}};
 }
 
 void ProjectJson::write(const std::string& fileName, const Tracks& tracks) const
@@ -88,6 +104,7 @@ void ProjectJson::write(const std::string& fileName, const Tracks& tracks) const
         {"cycle", range(m_project.cycleLeft(), m_project.cycleRight())},
         {"position", time(m_project.position().getValue())},
         {"attributes", attributesOf(m_project)},
+        {"lastRun", lastRun()},
     };
     m_sink("{\n");
     for (const auto& [key, value] : facts.items())

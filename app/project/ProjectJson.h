@@ -4,6 +4,7 @@
 
 #include "app/project/ProjectClock.h"
 #include "app/project/ProjectContent.h"
+#include "app/project/StoredModel.h"
 
 #include <functional>
 #include <nlohmann/json.hpp>
@@ -20,12 +21,14 @@ class ProjectJson {
 public:
     using Sink = std::function<void(std::string_view)>;
 
-    ProjectJson(standin::Project& project, const ProjectClock& clock, Sink sink);
+    /// The first three outlive this.
+    ProjectJson(standin::Project& project, const ProjectClock& clock, const StoredModel& stored, Sink sink);
 
     /// Gives the document to the sink piece by piece, so that a million events need the memory of one.
     void write(const std::string& fileName, const Tracks& tracks) const;
 
 private:
+    nlohmann::ordered_json lastRun() const;
     void writeTrack(const standin::Track& track) const;
     void writeEvents(const standin::Container& container, double start, std::size_t depth) const;
     void writeCurve(const standin::Envelope& curve) const;
@@ -37,6 +40,7 @@ private:
 
     standin::Project& m_project;
     const ProjectClock& m_clock;
+    const StoredModel& m_stored;
     Sink m_sink;
 };
 

@@ -4,17 +4,24 @@
 
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
+#include "app/edl/GenerationReport.h"
+#include "host/track/TrackRole.h"
 #include "standin/base/AttributeList.h"
 #include "standin/base/Utf16.h"
+#include "util/StringUtil.h"
+#include "velmark/Attributes.h"
 
 #include <algorithm>
 #include <array>
+#include <cstdint>
 #include <cstdio>
 #include <map>
+#include <optional>
 #include <ostream>
 
 namespace cadrel::app {
 
+using host::TrackRole;
 using standin::Attribute;
 using standin::AttributeList;
 using standin::AutomationPoint;
@@ -24,6 +31,8 @@ using standin::MediaClip;
 using standin::Node;
 using standin::toUtf8;
 using standin::Track;
+using util::StringUtil;
+using Velmark::AttributeKey;
 
 namespace {
 
@@ -72,11 +81,44 @@ std::string textOf(const Attribute& attribute)
     return std::string("(") + joined(values) + ")";
 }
 
+/// What a role of a track means; empty for a number that means nothing.
+std::string roleInWords(Velmark::int64 stored)
+{
+    const auto role = static_cast<std::int32_t>(stored & ~Velmark::int64{TrackRole::OwnVideo});
+    if (role < TrackRole::Destination || role > TrackRole::OldVideo)
+        return {};
+    const std::string own = role == stored ? "" : ", with a video of your own";
+    return "Cadrel's track: " + StringUtil::toUtf8(TrackRole::nameOf(role)) + own;
+}
+
+/// What an attribute of Cadrel's own says to people, which may be nothing; null for another.
+std::optional<std::string> meaningOf(const std::string& key, const Attribute& attribute)
+{
+    if (key == AttributeKey::Storage || key == AttributeKey::StorageChecksum || key == AttributeKey::EventUserId)
+        return std::string();
+    const auto* const number = std::get_if<Velmark::int64>(&attribute.value);
+    const auto* const text = std::get_if<std::string>(&attribute.value);
+    if (key == AttributeKey::Reel && text)
+        return "reel " + toPrintable(*text, MostCharactersOfAValue).text;
+    if (key == AttributeKey::LockState && number)
+        return std::string(*number == 1 ? "held locked for a preview" : "");
+    const bool isRole =
+        key == AttributeKey::MarkerType || key == AttributeKey::VideoType || key == AttributeKey::FolderType;
+    if (isRole && number && !roleInWords(*number).empty())
+        return roleInWords(*number);
+    return std::nullopt;
+}
+
 std::vector<std::string> attributesOf(const Node& node)
 {
     std::vector<std::string> texts;
-    for (const auto& [key, attribute] : node.attributes())
-        texts.push_back(toPrintable(key, MostCharactersOfAName).text + " " + textOf(attribute));
+    for (const auto& [key, attribute] : node.attributes()) {
+        const std::optional<std::string> meaning = meaningOf(key, attribute);
+        if (!meaning)
+            texts.push_back(toPrintable(key, MostCharactersOfAName).text + " " + textOf(attribute));
+        else if (!meaning->empty())
+            texts.push_back(*meaning);
+    }
     return texts;
 }
 
@@ -134,8 +176,9 @@ std::string stateOf(const Track& track, const std::string& locked, const std::st
 
 } // namespace
 
-ProjectListing::ProjectListing(standin::Project& project, const ProjectClock& clock, bool colour)
-    : m_project(project), m_clock(clock), m_colour(colour)
+ProjectListing::ProjectListing(standin::Project& project, const ProjectClock& clock, const StoredModel& stored,
+                               bool colour)
+    : m_project(project), m_clock(clock), m_stored(stored), m_colour(colour)
 {
 }
 
@@ -171,6 +214,23 @@ void ProjectListing::printFacts(std::ostream& out, const std::string& fileName) 
         out << title << attribute << '\n';
         title = "             ";
     }
+    printStored(out);
+}
+
+void ProjectListing::printStored(std::ostream& out) const
+{
+    if (m_stored.isUnreadable())
+        out << "Last run     " << m_stored.fault() << '\n';
+    if (!m_stored.model())
+        return;
+    const core::DataModel& model = *m_stored.model();
+    const auto printList = [&out](const char* title, const core::EventList& events) {
+        out << title << (events.isEmpty() ? "none" : describeEvents(events, edlFilesOf(events))) << '\n';
+    };
+    printList("Old cut      ", model.oldEdl());
+    printList("New cut      ", model.newEdl());
+    printList("Change EDL   ", model.changeEdl());
+    out << settingsIn(model, m_project, m_clock).text("Settings     ");
 }
 
 void ProjectListing::printTree(std::ostream& out) const

@@ -5,6 +5,7 @@
 #include "app/console/Columns.h"
 #include "app/project/ProjectClock.h"
 #include "app/project/ProjectContent.h"
+#include "app/project/StoredModel.h"
 
 #include <iosfwd>
 #include <string>
@@ -16,7 +17,8 @@ namespace cadrel::app {
 /// A project for people: its facts, the tree of its tracks, what lies on them, and the media that they use.
 class ProjectListing {
 public:
-    ProjectListing(standin::Project& project, const ProjectClock& clock, bool colour);
+    /// All outlive the listing.
+    ProjectListing(standin::Project& project, const ProjectClock& clock, const StoredModel& stored, bool colour);
 
     void printFacts(std::ostream& out, const std::string& fileName) const;
     /// A line for each track of the project, those in a folder below it and further in.
@@ -27,6 +29,7 @@ public:
     void printPool(std::ostream& out) const;
 
 private:
+    void printStored(std::ostream& out) const;
     void printHeading(std::ostream& out, const standin::Track& track) const;
     void printEvents(std::ostream& out, const standin::Track& track, const Columns& columns) const;
     void printCurve(std::ostream& out, standin::Envelope& curve) const;
@@ -35,6 +38,7 @@ private:
 
     standin::Project& m_project;
     const ProjectClock& m_clock;
+    const StoredModel& m_stored;
     bool m_colour;
 };
 

@@ -4,7 +4,7 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Printable.h"
 #include "app/console/Terminal.h"
@@ -14,6 +14,7 @@
 #include "app/project/ProjectContent.h"
 #include "app/project/ProjectJson.h"
 #include "app/project/ProjectListing.h"
+#include "app/project/StoredModel.h"
 #include "standin/base/Utf16.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
@@ -88,22 +89,23 @@ Tracks tracksNamed(Project& project, const ShowOptions& options)
                   names.empty() ? "it has no tracks at all" : "give one of " + joined(names)};
 }
 
-void writeJson(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
+void writeJson(Project& project, const ProjectClock& clock, const StoredModel& stored, const Tracks& tracks,
+               const ShowOptions& options)
 {
     std::optional<Interruption> interruption;
-    if (!JsonOutput::isStandardOutput(options.jsonFile))
+    if (!Output::isStandardOutput(options.jsonFile))
         interruption.emplace();
-    JsonOutput json(options.jsonFile);
-    ProjectJson(project, clock, [&json](std::string_view text) {
+    Output json(options.jsonFile);
+    ProjectJson(project, clock, stored, [&json](std::string_view text) {
         json.write(text);
     }).write(fileNameOf(options.projectFile), tracks);
-    json.finish();
-    json.keep();
+    json.place();
 }
 
-void print(Project& project, const ProjectClock& clock, const Tracks& tracks, const ShowOptions& options)
+void print(Project& project, const ProjectClock& clock, const StoredModel& stored, const Tracks& tracks,
+           const ShowOptions& options)
 {
-    const ProjectListing listing(project, clock, Terminal::wantsColour());
+    const ProjectListing listing(project, clock, stored, Terminal::wantsColour());
     if (!options.trackName.empty()) {
         listing.printContent(std::cout, tracks);
         return;
@@ -125,19 +127,20 @@ void print(Project& project, const ProjectClock& clock, const Tracks& tracks, co
 
 void runShow(const ShowOptions& options, Terminal& terminal)
 {
-    const bool jsonOnly = JsonOutput::isStandardOutput(options.jsonFile);
+    const bool jsonOnly = Output::isStandardOutput(options.jsonFile);
     if (!options.jsonFile.empty() && !jsonOnly)
         refuseToOverwrite({options.projectFile}, options.jsonFile);
     Project& project = read(options.projectFile, terminal);
     const ProjectClock clock = clockOf(project, options.projectFile);
+    const StoredModel stored(project, clock);
     const Tracks tracks = tracksNamed(project, options);
 
     terminal.clearProgress();
     if (!options.jsonFile.empty())
-        writeJson(project, clock, tracks, options);
+        writeJson(project, clock, stored, tracks, options);
     if (jsonOnly)
         return;
-    print(project, clock, tracks, options);
+    print(project, clock, stored, tracks, options);
     flushStandardOutput();
 }
 

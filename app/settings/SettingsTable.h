@@ -62,24 +62,27 @@ struct SettingEntry {
                  RangeSetting, VfxSetting>
         kind;
     const char* help;
-    /// What a report says where the value isn't usual, with "{}" for the value; empty where it says nothing.
-    const char* whenUnusual;
 };
 
 /// Every setting that the program offers, in the order of its help and its reports.
 std::span<const SettingEntry> settingsTable();
 
-/// A time of the settings, which is in seconds, as a report writes it.
-using TimeText = std::function<std::string(double)>;
-
-/// What the settings say that isn't usual, in words.
-std::vector<std::string> unusualSettings(const core::Settings& settings, const TimeText& timeText);
+/// What clears the names of VFX shots.
+constexpr const char* NoVfxPatterns = "none";
 
 /// What the user wants otherwise than the settings have it.
 struct GivenSettings {
-    std::vector<std::function<void(core::Settings&)>> changes; ///< in the order in which they were given
-    std::vector<std::string> vfxPatterns;                      ///< "PREFIX,POSTFIX"; none: those of the settings
-    std::vector<std::string> preserve; ///< two timecodes of the project's clock; none: what the settings say
+    struct Change {
+        const SettingEntry* entry;
+        std::function<void(core::Settings&)> apply;
+    };
+
+    std::vector<Change> changes;          ///< in the order in which they were given
+    std::vector<std::string> vfxPatterns; ///< "PREFIX,POSTFIX", or NoVfxPatterns alone; none: those of the settings
+    std::vector<std::string> preserve;    ///< two timecodes of the project's clock; none: what the settings say
+
+    /// Whether the user gave it.
+    bool has(const SettingEntry& entry) const;
 };
 
 } // namespace cadrel::app

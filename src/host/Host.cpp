@@ -113,7 +113,7 @@ void Host::open(IProjectDocument* document)
     entry.registration.add([this, document] { document->removeStorageNotification(this); });
     requireOk(dependencies->addDependent(document, this));
     entry.registration.add([this, document, dependencies] { dependencies->removeDependent(document, this); });
-    entry.project = std::make_unique<Project>(m_context.get(), document);
+    entry.project = std::make_shared<Project>(m_context.get(), document);
     Project& project = *entry.project;
     m_projects.emplace(document, std::move(entry));
     // A project whose data can't be read stays, with an empty model.
@@ -130,7 +130,7 @@ int32 Host::projectDeactivated(IProjectDocument* /*project*/)
     return resultOf([&] { setCurrentProject(nullptr); });
 }
 
-void Host::setCurrentProject(Project* project)
+void Host::setCurrentProject(const std::shared_ptr<Project>& project)
 {
     // Everything is carried out, so that the window follows even if something fails.
     FirstFailure failure;
@@ -142,12 +142,12 @@ void Host::setCurrentProject(Project* project)
     if (m_currentProject)
         m_currentProject->model().setNotifier(nullptr);
     m_currentProject = project;
-    core::Timecode::setFramerateProvider(project);
+    core::Timecode::setFramerateProvider(project.get());
     if (project) {
         project->model().setNotifier(this);
         failure.ofStep([&] { project->model().notifyPreviewState(); });
     }
-    failure.ofStep([&] { m_videoProvider->setProject(project); });
+    failure.ofStep([&] { m_videoProvider->setProject(project.get()); });
     failure.ofStep([&] { notify(core::DataModelChangeContext(getProjectModel())); });
     tellDropped(dropped);
     failure.raise();
@@ -164,7 +164,7 @@ void Host::close(IProjectDocument* document)
     if (found == m_projects.end())
         return;
     found->second.registration.run();
-    if (found->second.project.get() == m_currentProject)
+    if (found->second.project == m_currentProject)
         projectDeactivated(document);
     m_projects.erase(found);
 }
@@ -176,7 +176,7 @@ int32 Host::projectRenamed(IProjectDocument* /*project*/)
 
 int32 Host::projectStoring(IProjectDocument* project)
 {
-    const Result::Type result = resultOf([&] { required(find(project))->save(); });
+    const Result::Type result = resultOf([&] { required(find(project).get())->save(); });
     if (result != Result::Ok)
         showAlert(L"An error occurred while saving the Cadrel data.");
     return result;
@@ -188,7 +188,7 @@ int32 Host::update(FUnknown* changed, int32 /*message*/)
         return ResultOk;
     return resultOf([&] {
         const auto document = query<IProjectDocument>(changed);
-        Project* const project = find(document.get());
+        const std::shared_ptr<Project> project = find(document.get());
         if (!project)
             return;
         const FramerateScope rate(*project);
@@ -209,50 +209,47 @@ void Host::notify(const core::ChangeContext& context)
 /// and the user at its place, and the next would take that for the user's own.
 void Host::settleAfterUndo(Project& project)
 {
-    // What an edit that failed has left there, is gone.
-    project.setLeftovers(false);
     FirstFailure failure;
-    if (project.model().isPreviewActive() && !project.hasLockTracks())
-        failure.ofStep([&] { lockAgain(project); });
+    const bool isActive = project.model().isPreviewActive();
     project.findLockedTracks();
     // A preview that has come back needs its room, and one that has gone doesn't.
-    if (!project.model().isPreviewActive() || project.hasPreviewOffset())
+    if (!isActive || project.hasPreviewOffset())
         failure.ofStep([&] { project.extendProjectEnd(false); });
-    if (project.model().isPreviewActive() || !project.hasLockTracks()) {
-        failure.raise();
-        return;
-    }
-    failure.ofStep([&] { restoreCycles(); });
-    failure.ofStep([&] { project.setTracksLocked(false); });
-    project.releaseLockTracks();
+    if (!isActive && project.hasLockTracks())
+        failure.ofStep([&] { restoreCycles(project); });
+    failure.ofStep([&] { settleLocks(project); });
     failure.raise();
 }
 
-void Host::lockAgain(Project& project)
+void Host::settleLocks(Project& project)
 {
+    project.setTracksLocked(false);
+    project.releaseLockTracks();
+    if (!project.model().isPreviewActive())
+        return;
+    project.findPreviewedTracks();
     core::Variant isAtDestination(false);
     project.model().getProperty(core::PropertyKey::PreviewAtDestination, isAtDestination);
-    if (project.previewEvents().isEmpty() || !isAtDestination.toBool())
-        return;
-    project.collectLockTracks();
-    project.setTracksLocked(true);
+    if (project.hasLockTracks() && isAtDestination.toBool())
+        project.setTracksLocked(true);
 }
 
 int32 Host::projectEdited(IProjectDocument* project, IEditTransaction* transaction)
 {
-    if (m_processing || !m_currentProject || project != m_currentProject->document())
+    const std::shared_ptr<Project> edited = m_currentProject;
+    if (m_processing || !edited || project != edited->document())
         return ResultOk;
     const Result::Type result = resultOf([&] {
-        const FramerateScope rate(*m_currentProject);
-        m_currentProject->onProjectEdited(*required(transaction));
+        const FramerateScope rate(*edited);
+        edited->onProjectEdited(*required(transaction));
     });
     return result == Result::Ok ? result : Result::HostObjectMissing;
 }
 
-Project* Host::find(IProjectDocument* document) const
+std::shared_ptr<Project> Host::find(IProjectDocument* document) const
 {
     const auto found = m_projects.find(document);
-    return found != m_projects.end() ? found->second.project.get() : nullptr;
+    return found != m_projects.end() ? found->second.project : nullptr;
 }
 
 void Host::showAlert(const std::wstring& message)

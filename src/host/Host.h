@@ -141,7 +141,7 @@ protected:
 private:
     struct OpenProject {
         Teardown registration; ///< with the host
-        std::unique_ptr<Project> project;
+        std::shared_ptr<Project> project;
     };
     /// The names of an entry of the undo list, not translated.
     struct EntryName {
@@ -165,11 +165,11 @@ private:
     void open(Velmark::IProjectDocument* document);
     void close(Velmark::IProjectDocument* document);
     /// Null for what isn't registered.
-    Project* find(Velmark::IProjectDocument* document) const;
-    void setCurrentProject(Project* project);
+    std::shared_ptr<Project> find(Velmark::IProjectDocument* document) const;
+    void setCurrentProject(const std::shared_ptr<Project>& project);
     void settleAfterUndo(Project& project);
-    /// The tracks of a preview that a redo has brought back, where its new place is looked at.
-    static void lockAgain(Project& project);
+    /// Locks the tracks of the preview that is on, where its new place is looked at, and frees all others.
+    static void settleLocks(Project& project);
     static void showAlert(const std::wstring& message);
 
     // Runs and previews, in HostRuns.cpp.
@@ -185,16 +185,25 @@ private:
     util::Result::Type finishPreview(const EntryName& name);
     /// Tells the user when his lock has kept the new video from its track.
     static void tellOfVideo(bool isWritten);
+
+    // The user may close or leave the project while the progress window lets events through. So the project is held, and
+    // the edit ends as soon as it isn't the active one any more.
+
     /// The frame of a run or preview of so many events around its transaction.
-    util::Result::Type withProgress(const Appearance& appearance, std::size_t eventCount,
+    util::Result::Type withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,
                                     const std::function<void()>& work);
     /// Carries out steps as one entry of the undo list. What they throw is the result, and the name of the entry says so.
-    util::Result::Type edit(const EntryName& name, const std::function<void(Velmark::IEditTransaction&)>& steps);
-    util::Result::Type commit(const char16_t* name);
-    void takeBack(Velmark::IActionManager& actions);
-    void restoreCycles();
-    void keepCycles();
-    void joinPieces(double start, double end);
+    util::Result::Type edit(Project& project, const EntryName& name,
+                            const std::function<void(Velmark::IEditTransaction&)>& steps);
+    util::Result::Type commit(Project& project, const char16_t* name);
+    void takeBack(Project& project, Velmark::IActionManager& actions);
+    /// Throws Result::NoProject unless the project is the active one.
+    void requireActive(const Project& project) const;
+    /// The active project, for a step of the engine; null without one. Throws Result::NoProject when an edit is open in
+    /// another.
+    Project* engineProject() const;
+    void restoreCycles(Project& project);
+    void keepCycles(Project& project);
     /// Makes sure that there is a preview offset, and throws what keeps a run from beginning.
     void prepareStart();
     /// The one that is open.
@@ -204,7 +213,8 @@ private:
     Velmark::Counted<Velmark::IHostContext> m_context;
     Velmark::Counted<Velmark::IProjectManager> m_projectManager;
     std::map<Velmark::IProjectDocument*, OpenProject> m_projects;
-    Project* m_currentProject = nullptr; ///< not owned
+    std::shared_ptr<Project> m_currentProject;
+    const Project* m_editedProject = nullptr; ///< of the transaction that is open
     /// The one that is open and has to be committed; nothing outside of a run, a preview or the end of one.
     Velmark::Counted<Velmark::IEditTransaction> m_transaction;
     Velmark::Counted<Velmark::IHostContext> m_serviceContext;

@@ -94,87 +94,98 @@ bool Host::isPreviewActive()
 
 Result::Type Host::removeVirginTerritoryMarkers()
 {
-    if (!m_currentProject)
+    Project* const project = engineProject();
+    if (!project)
         return Result::NoProject;
     // What is no longer in the preview stretch isn't followed any more either.
-    m_currentProject->previewEvents().clear();
-    m_currentProject->clearPreview(openTransaction());
+    project->previewEvents().clear();
+    project->clearPreview(openTransaction());
+    project->startWriting();
     return Result::Ok;
 }
 
 Result::Type Host::processEvent(core::Cut& cut)
 {
-    if (!m_currentProject)
+    Project* const project = engineProject();
+    if (!project)
         return Result::NoProject;
     if (m_progress && m_progress->isCancelled())
         return Result::Cancelled;
-    m_currentProject->processCut(openTransaction(), cut);
+    project->processCut(openTransaction(), cut);
     return Result::Ok;
 }
 
 std::shared_ptr<core::Cut> Host::makeCutEvents(const std::shared_ptr<core::EventBase>& changeEvent)
 {
-    if (!m_currentProject)
+    Project* const project = engineProject();
+    if (!project)
         return std::make_shared<core::Cut>(changeEvent, core::Cut::CutEvents());
-    return m_currentProject->makeCut(changeEvent);
+    return project->makeCut(changeEvent);
 }
 
 Result::Type Host::completeCadrel()
 {
-    if (!m_currentProject)
+    Project* const project = engineProject();
+    if (!project)
         return Result::Ok;
     announce(L"Completing");
-    m_currentProject->completeApply(openTransaction());
+    project->completeApply(openTransaction());
     return Result::Ok;
 }
 
 Result::Type Host::generateMarkers(const std::vector<core::MarkerEntry>& entries)
 {
-    if (!m_currentProject)
+    Project* const project = engineProject();
+    if (!project)
         return Result::Ok;
     announce(L"Generate Markers");
     if (m_progress)
         m_progress->beginStage(entries.size());
-    m_currentProject->generateMarkers(openTransaction(), entries);
+    project->generateMarkers(openTransaction(), entries);
     return Result::Ok;
 }
 
 core::CadrelRunState Host::getRunState()
 {
-    return m_currentProject ? m_currentProject->runState() : core::CadrelRunState();
+    Project* const project = engineProject();
+    return project ? project->runState() : core::CadrelRunState();
 }
 
 core::CadrelPreviewState Host::getPreviewState()
 {
-    return m_currentProject ? m_currentProject->previewState() : core::CadrelPreviewState();
+    Project* const project = engineProject();
+    return project ? project->previewState() : core::CadrelPreviewState();
 }
 
 Result::Type Host::applyVirginTerritories(core::CutList& cuts)
 {
+    Project* const project = engineProject();
     const Result::Type result = CadrelerBase::applyVirginTerritories(cuts);
-    if (result != Result::Ok || !m_currentProject)
+    if (result != Result::Ok || !project)
         return result;
-    m_currentProject->holdAutomation(openTransaction(), cuts, m_served == core::ActionChangeContext::Run);
-    if (!m_currentProject->model().settings().createVirginTerritories())
+    project->holdAutomation(openTransaction(), cuts, m_served == core::ActionChangeContext::Run);
+    if (!project->model().settings().createVirginTerritories())
         return result;
     announce(L"Virgin Territories");
-    m_currentProject->markVirginTerritories(openTransaction(), cuts);
+    project->markVirginTerritories(openTransaction(), cuts);
     return Result::Ok;
 }
 
 Result::Type Host::setProjectEvents(const core::EventList& events)
 {
-    if (m_currentProject)
-        m_currentProject->previewEvents().copyFrom(events);
+    Project* const project = engineProject();
+    if (project)
+        project->previewEvents().copyFrom(events);
     return Result::Ok;
 }
 
 std::uint64_t Host::estimateSteps(std::uint64_t eventCount, const core::Settings& settings,
                                   std::uint64_t /*trackCount*/)
 {
-    if (!m_currentProject)
+    Project* const project = engineProject();
+    if (!project)
         return 0;
-    const std::vector<Track> candidates = m_currentProject->availableTracks();
+    const std::vector<Track> candidates = project->availableTracks();
     const bool onlySelected = settings.applyTo() == core::ApplyTo::SelectedTracks;
     const auto tracks = static_cast<std::uint64_t>(
         std::ranges::count_if(candidates, [&](const Track& track) { return !onlySelected || track.isSelected(); }));
@@ -183,10 +194,18 @@ std::uint64_t Host::estimateSteps(std::uint64_t eventCount, const core::Settings
     return CadrelerBase::estimateSteps(eventCount, settings, tracks) + ofCuts + ofTerritories;
 }
 
+Project* Host::engineProject() const
+{
+    if (m_editedProject)
+        requireActive(*m_editedProject);
+    return m_currentProject.get();
+}
+
 IEditTransaction& Host::openTransaction() const
 {
     if (!m_transaction)
         throw Result::NotAvailable;
+    requireActive(*m_editedProject);
     return *m_transaction;
 }
 

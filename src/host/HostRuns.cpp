@@ -150,16 +150,18 @@ Result::Type Host::canStart()
 
 Result::Type Host::runCadrel()
 {
-    if (!m_currentProject)
+    const std::shared_ptr<Project> held = m_currentProject;
+    if (!held)
         return Result::NoProject;
-    Project& project = *m_currentProject;
+    Project& project = *held;
     const core::EventList& changeList = project.model().changeEdl();
-    return withProgress({L"Processing Project", true}, changeList.size(), [&] {
+    return withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
         Counted<IActionManager> actions; // once the user has cancelled
         bool isVideoWritten = true;
-        const Result::Type result = edit(Apply, [&](IEditTransaction& transaction) {
+        const Result::Type result = edit(project, Apply, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle);
+            requireSuccess(removeVirginTerritoryMarkers());
             project.createMarkerTracks(transaction);
             const Result::Type ran = run(changeList);
             if (ran == Result::Cancelled) {
@@ -168,17 +170,17 @@ Result::Type Host::runCadrel()
                 return;
             }
             requireSuccess(ran);
+            requireActive(project);
             project.createVideoTracks(transaction);
             isVideoWritten = m_videoProvider->apply(true, transaction, 0.0);
             double start = 0.0;
             double end = 0.0;
             project.getApplyRange(start, end);
-            joinPieces(start, end);
+            project.closeRange(isOnlySelected(project.model().settings()), start, end);
         });
         requireSuccess(result);
         if (actions) {
-            project.setLeftovers(true);
-            takeBack(*actions);
+            takeBack(project, *actions);
             throw Result::Cancelled;
         }
         tellOfVideo(isVideoWritten);
@@ -188,24 +190,31 @@ Result::Type Host::runCadrel()
 Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                               std::uint32_t options)
 {
-    if (!m_currentProject)
+    const std::shared_ptr<Project> held = m_currentProject;
+    if (!held)
         return Result::NoProject;
-    Project& project = *m_currentProject;
-    return withProgress({L"Project Preview", false}, events.size(), [&] {
+    Project& project = *held;
+    return withProgress(project, {L"Project Preview", false}, events.size(), [&] {
         bool isVideoWritten = true;
-        requireSuccess(edit(Preview, [&](IEditTransaction& transaction) {
+        requireSuccess(edit(project, Preview, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle, m_modelSnapshot);
+            requireSuccess(removeVirginTerritoryMarkers());
             project.createVideoTracks(transaction);
             project.createMarkerTracks(transaction);
             requireSuccess(CadrelerBase::startPreview(events, first, last, options));
+            requireActive(project);
             const double offset = project.previewOffset();
             isVideoWritten = m_videoProvider->apply(true, transaction, offset);
             // Without material in the preview the project ends before it.
-            joinPieces(offset, std::max(offset, project.projectEnd()));
+            project.closeRange(isOnlySelected(project.model().settings()), offset,
+                               std::max(offset, project.projectEnd()));
             project.previewEvents().copyFrom(events);
+            // Of no events nothing is shown.
+            if (!events.isEmpty())
+                project.collectLockTracks();
         }));
-        project.collectLockTracks();
+        requireActive(project);
         requireSuccess(cycleToEvents(events, first, last, options));
         tellOfVideo(isVideoWritten);
     });
@@ -213,14 +222,15 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
 
 Result::Type Host::finishPreview(const EntryName& name)
 {
-    if (!m_currentProject)
+    const std::shared_ptr<Project> held = m_currentProject;
+    if (!held)
         return Result::Ok;
-    Project& project = *m_currentProject;
-    if (!project.hasPreviewOffset()) {
+    Project& project = *held;
+    if (!project.hasPreviewOffset() && !project.hasWritten()) {
         project.previewEvents().clear();
         return Result::Ok;
     }
-    return edit(name, [&](IEditTransaction& transaction) {
+    return edit(project, name, [&](IEditTransaction& transaction) {
         project.previewEvents().clear();
         core::EditTransactionHandle handle(transaction);
         const auto command = createCommand(handle);
@@ -236,9 +246,9 @@ void Host::tellOfVideo(bool isWritten)
         showAlert(L"The track of the new video is locked. The new video hasn't been written.");
 }
 
-Result::Type Host::withProgress(const Appearance& appearance, std::size_t eventCount, const std::function<void()>& work)
+Result::Type Host::withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,
+                                const std::function<void()>& work)
 {
-    Project& project = *m_currentProject;
     ProgressHandler progress(m_serviceContext.get());
     const auto idleManager = service<IIdleManager>(m_serviceContext);
     bool isBlocked = false;
@@ -263,22 +273,30 @@ Result::Type Host::withProgress(const Appearance& appearance, std::size_t eventC
     return result;
 }
 
-Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTransaction&)>& steps)
+Result::Type Host::edit(Project& project, const EntryName& name, const std::function<void(IEditTransaction&)>& steps)
 {
-    core::EventList& previewed = m_currentProject->previewEvents();
+    core::EventList& previewed = project.previewEvents();
     const PreviewEventsStep::Events previewedBefore = previewed.events();
     m_processing = true;
     Result::Type result = resultOf([&] {
+        requireActive(project);
         auto transaction = required(query<IEditTransaction>(required(service<IEditService>(m_serviceContext))));
         requireOk(transaction->begin(true));
         m_transaction = std::move(transaction);
+        m_editedProject = &project;
         steps(*m_transaction);
+        requireActive(project);
     });
     if (m_transaction) {
         const Result::Type kept = resultOf([&] {
-            if (previewed.events() != previewedBefore)
-                requireOk(m_transaction->addStep(
-                    makeCounted<PreviewEventsStep>(m_currentProject->sharedPreviewEvents(), previewedBefore).get()));
+            FirstFailure failure;
+            failure.ofStep([&] { project.rememberWritten(); });
+            failure.ofStep([&] {
+                if (previewed.events() != previewedBefore)
+                    requireOk(m_transaction->addStep(
+                        makeCounted<PreviewEventsStep>(project.sharedPreviewEvents(), previewedBefore).get()));
+            });
+            failure.raise();
         });
         // Otherwise a memo might be carried over to the wrong place.
         if (kept != Result::Ok)
@@ -286,42 +304,44 @@ Result::Type Host::edit(const EntryName& name, const std::function<void(IEditTra
         if (result == Result::Ok)
             result = kept;
         if (result == Result::Ok)
-            result = commit(name.done);
+            result = commit(project, name.done);
         if (result != Result::Ok)
-            commit(name.incomplete);
+            commit(project, name.incomplete);
         m_transaction.reset();
+        m_editedProject = nullptr;
     }
     m_processing = false;
-    m_currentProject->setLeftovers(result != Result::Ok);
     return result;
 }
 
-Result::Type Host::commit(const char16_t* name)
+Result::Type Host::commit(Project& project, const char16_t* name)
 {
-    return resultOf(
-        [&] { requireOk(m_transaction->commit(m_currentProject->document(), m_translator->translate(name))); });
+    return resultOf([&] { requireOk(m_transaction->commit(project.document(), m_translator->translate(name))); });
 }
 
 /// Undoes the run that the user has cancelled.
-void Host::takeBack(IActionManager& actions)
+void Host::takeBack(Project& project, IActionManager& actions)
 {
+    // The host would undo what was done in another.
+    requireActive(project);
     // The undo removes tracks that it holds.
-    m_currentProject->setUseTrackCache(false);
+    project.setUseTrackCache(false);
     requireOk(actions.invoke(IActionManager::EditCategory, IActionManager::Undo, 0));
 }
 
-/// Joins what a run has split and put together again.
-void Host::joinPieces(double start, double end)
+void Host::requireActive(const Project& project) const
 {
-    m_currentProject->closeRange(isOnlySelected(m_currentProject->model().settings()), start, end);
+    if (m_currentProject.get() != &project)
+        throw Result::NoProject;
 }
 
 Result::Type Host::endPreview()
 {
     const std::vector<std::int32_t> dropped = dropRequests();
+    const std::shared_ptr<Project> held = m_currentProject;
     std::optional<LoweredPreviewFlag> lowered;
-    if (m_currentProject && m_restorePreviewState)
-        lowered.emplace(m_currentProject->model());
+    if (held && m_restorePreviewState)
+        lowered.emplace(held->model());
     const Result::Type result = finishPreview(DeletePreviewRange);
     lowered.reset();
     tellDropped(dropped);
@@ -330,9 +350,10 @@ Result::Type Host::endPreview()
 
 void Host::setPreviewActive(bool active)
 {
-    if (!m_currentProject)
+    const std::shared_ptr<Project> held = m_currentProject;
+    if (!held)
         return;
-    Project& project = *m_currentProject;
+    Project& project = *held;
     core::DataModel& model = project.model();
     const bool wasActive = model.isPreviewActive();
     FirstFailure failure;
@@ -342,32 +363,36 @@ void Host::setPreviewActive(bool active)
         m_restorePreviewState = false;
     }
     if (wasActive && !active) {
-        failure.ofStep([&] { restoreCycles(); });
+        failure.ofStep([&] { restoreCycles(project); });
         failure.ofStep([&] { requireSuccess(finishPreview(EndPreview)); });
     }
     if (!wasActive && active)
         m_restorePreviewState = true;
-    // Once the preview is on, its place doesn't change.
     if (active)
         failure.ofStep([&] { project.ensurePreviewOffset(); });
     model.setPreviewActive(active);
-    failure.ofStep([&] { model.notifyPreviewState(); });
+    failure.ofStep([&] {
+        requireActive(project);
+        model.notifyPreviewState();
+    });
     if (!active) {
+        failure.ofStep([&] { project.findLockedTracks(); });
         failure.ofStep([&] { project.setTracksLocked(false); });
         project.releaseLockTracks();
     } else if (!wasActive) {
         // The stored cycle is the one from before the preview moved it.
-        failure.ofStep([&] { keepCycles(); });
+        failure.ofStep([&] { keepCycles(project); });
     }
     failure.ofStep([&] { project.extendProjectEnd(active); });
     tellDropped(dropped);
     failure.raise();
 }
 
-void Host::keepCycles()
+void Host::keepCycles(Project& project)
 {
     using Key = core::PropertyKey;
-    core::DataModel& model = m_currentProject->model();
+    requireActive(project);
+    core::DataModel& model = project.model();
     // A value that can't be read isn't restored. The one from before an earlier preview would be wrong.
     for (const std::int32_t key : {Key::ProjectCycleLeft, Key::ProjectCycleRight, Key::TransportCycleLower,
                                    Key::TransportCycleUpper, Key::TransportPosition})
@@ -394,10 +419,11 @@ void Host::keepCycles()
     failure.raise();
 }
 
-void Host::restoreCycles()
+void Host::restoreCycles(Project& project)
 {
     using Key = core::PropertyKey;
-    const core::DataModel& model = m_currentProject->model();
+    requireActive(project);
+    const core::DataModel& model = project.model();
     const auto kept = [&](std::int32_t key) -> std::optional<double> {
         core::Variant value;
         if (model.getProperty(key, value) != Result::Ok)

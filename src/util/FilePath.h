@@ -11,4 +11,8 @@ namespace cadrel::util {
 /// name with a zero character, which the system would take for the shorter name in front of it.
 std::filesystem::path toFilePath(const std::wstring& name);
 
+/// The file that a symbolic link points to, which need not exist; another path as it is. Throws
+/// Result::FileAccessFailed for links that go round in circles.
+std::filesystem::path followLinks(std::filesystem::path path);
+
 } // namespace cadrel::util

@@ -2,6 +2,7 @@
 
 #include "util/FileReplacement.h"
 
+#include "util/FilePath.h"
 #include "util/Result.h"
 
 #include <cerrno>
@@ -17,24 +18,9 @@ namespace fs = std::filesystem;
 
 namespace {
 
-/// The system itself follows as many.
-constexpr int MostLinks = 40;
 /// Content is collected up to so many bytes before it is written.
 constexpr std::size_t WellFilled = 1 << 16;
 constexpr mode_t ReadableAndWritable = 0666; // less what the user's mask takes away
-
-/// The file that a symbolic link points to, which need not exist.
-fs::path followLinks(fs::path path)
-{
-    std::error_code error;
-    for (int count = 0; fs::is_symlink(path, error); ++count) {
-        const fs::path next = fs::read_symlink(path, error);
-        if (error || count == MostLinks)
-            throw Result::FileAccessFailed;
-        path = path.parent_path() / next;
-    }
-    return path;
-}
 
 /// A hidden name in the same folder. It doesn't hold the target's name, which may be as long as a name can be.
 fs::path unusedNameBeside(const fs::path& target)
@@ -200,11 +186,13 @@ void FileReplacement::keep()
     m_isPlaced = false;
 }
 
-void FileReplacement::commit()
+void FileReplacement::commit(const std::optional<FileStamp>& expected)
 {
     finish();
     if (m_target.empty())
         return;
+    if (expected && FileStamp::of(m_target) != *expected)
+        throw TargetChanged{};
     moveToTarget();
     syncFolderOf(m_target);
 }

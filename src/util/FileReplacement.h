@@ -2,7 +2,10 @@
 
 #pragma once
 
+#include "util/FileStamp.h"
+
 #include <filesystem>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -26,6 +29,9 @@ namespace cadrel::util {
 /// Without `keep`, the destructor restores the former files.
 class FileReplacement {
 public:
+    /// Thrown by `commit`.
+    struct TargetChanged {};
+
     /// Throws Result::FileAccessFailed when the target can't be written, as for a folder or a write-protected file.
     explicit FileReplacement(const std::filesystem::path& target);
     FileReplacement(const FileReplacement&) = delete;
@@ -44,7 +50,10 @@ public:
 
     /// Finishes the file and replaces the former one in one step, so that the target exists at every moment. Throws
     /// Result::FileAccessFailed. The new file is in place nevertheless if the disk fails in the very last step.
-    void commit();
+    ///
+    /// With an `expected` stamp, the target has to be as it was then: TargetChanged is thrown, and the target stays, if
+    /// another program has written it since. A target that is written directly isn't looked at.
+    void commit(const std::optional<FileStamp>& expected = std::nullopt);
 
 private:
     void openBeside();

@@ -122,6 +122,12 @@ struct AttributeKey {
     static constexpr const char* StorageChecksum = "CaDs";
     /// On a track: 1 while Cadrel holds it locked, 0 afterwards.
     static constexpr const char* LockState = "Cadrel:LockState";
+    /// On a track that a preview shows or that has something left of a run: an IAttributeData with numbers.
+    static constexpr const char* Preview = "Cadrel:Preview";
+    /// On the project while a preview has room past its end: an IAttributeData with numbers.
+    static constexpr const char* ProjectEnd = "Cadrel:ProjectEnd";
+    /// In both lists: the numbers.
+    static constexpr const char* Numbers = "Numbers";
     /// On a marker, a video and a folder track: the role of the track, an integer.
     static constexpr const char* MarkerType = "Cadrel:MarkerType";
     static constexpr const char* VideoType = "Cadrel:VideoType";

@@ -13,8 +13,9 @@ namespace standin {
 
 namespace {
 
-/// Values of a curve that are closer than this are the same.
-constexpr double SameValue = 1e-9;
+/// Values of a curve that are closer than this are the same. What comes through the interface is a 32-bit float, and so is
+/// what a curve is held at.
+constexpr double SameValue = 1e-7;
 
 bool isHoldingPoint(const Counted<AutomationPoint>& point)
 {

@@ -18,16 +18,19 @@ namespace standin {
 
 namespace fs = std::filesystem;
 
+using cadrel::util::FileReplacement;
+using cadrel::util::FileStamp;
 using Velmark::Counted;
 
 namespace {
 
+template <class Error = ProjectFileError>
 [[noreturn]] void fail(std::string name, const std::string& fault)
 {
     // A name may hold anything, but the message is one line.
     std::ranges::replace_if(
         name, [](char byte) { return (byte >= 0 && byte < 0x20) || byte == 0x7F; }, '?');
-    throw ProjectFileError(name + ": " + fault);
+    throw Error(name + ": " + fault);
 }
 
 std::string contentOf(const fs::path& file)
@@ -70,15 +73,17 @@ Counted<Project> ProjectFile::parse(std::string_view text, const std::string& na
     }
 }
 
-void ProjectFile::write(const Project& project, const fs::path& file)
+void ProjectFile::write(const Project& project, const fs::path& file, const std::optional<FileStamp>& expected)
 {
     try {
         const std::string text = ProjectWriter::textOf(project);
-        cadrel::util::FileReplacement replacement(file);
+        FileReplacement replacement(file);
         replacement.write(text);
-        replacement.commit();
+        replacement.commit(expected);
     } catch (const FileFault& fault) {
         fail(file.string(), std::string("this project can't be stored: ") + fault.what());
+    } catch (const FileReplacement::TargetChanged&) {
+        fail<ProjectFileChanged>(file.string(), "another program has written it meanwhile");
     } catch (const cadrel::util::Result::Type&) {
         fail(file.string(), "can't be written");
     }

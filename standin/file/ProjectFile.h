@@ -2,9 +2,11 @@
 
 #pragma once
 
+#include "util/FileStamp.h"
 #include "velmark/Counted.h"
 
 #include <filesystem>
+#include <optional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -20,6 +22,12 @@ public:
     using std::runtime_error::runtime_error;
 };
 
+/// Another program has written the file that a project was to replace.
+class ProjectFileChanged : public ProjectFileError {
+public:
+    using ProjectFileError::ProjectFileError;
+};
+
 /// The form in which projects are stored: JSON, described in docs/project-file.md. The same project always gives the same
 /// bytes, and a project that was read from them gives them again.
 class ProjectFile {
@@ -30,9 +38,10 @@ public:
     static Velmark::Counted<Project> read(const std::filesystem::path& file, ChangeLog& log);
     /// The same from the content of a file; `name` is for the errors alone.
     static Velmark::Counted<Project> parse(std::string_view text, const std::string& name, ChangeLog& log);
-    /// Replaces the file in one step: whatever happens, there is either the whole former file or the whole new one.
-    /// Throws ProjectFileError.
-    static void write(const Project& project, const std::filesystem::path& file);
+    /// Replaces the file in one step: whatever happens, there is either the whole former file or the whole new one. With an
+    /// `expected` stamp the file has to be as it was then; else ProjectFileChanged is thrown. Throws ProjectFileError.
+    static void write(const Project& project, const std::filesystem::path& file,
+                      const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
     /// The content of the file. Throws ProjectFileError, without a name, for a project that no file can hold.
     static std::string toText(const Project& project);
 };

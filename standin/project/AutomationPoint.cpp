@@ -2,9 +2,27 @@
 
 #include "standin/project/AutomationPoint.h"
 
+#include <array>
+#include <charconv>
+#include <utility>
+
 using namespace Velmark;
 
 namespace standin {
+
+namespace {
+
+/// The number that a value of 32 bits stands for: 0.1, and not 0.100000001490116. It reads as the same value again.
+double meantBy(float value)
+{
+    std::array<char, 32> text{};
+    const auto end = std::to_chars(text.data(), text.data() + text.size(), value).ptr;
+    double number = 0.0;
+    std::from_chars(text.data(), end, number);
+    return static_cast<float>(number) == value ? number : static_cast<double>(value);
+}
+
+} // namespace
 
 float AutomationPoint::getValue()
 {
@@ -15,7 +33,7 @@ int32 AutomationPoint::setValue(float value)
 {
     if (!(value >= 0.0f && value <= 1.0f))
         return ResultFalse;
-    setValue(static_cast<double>(value));
+    setValue(meantBy(value));
     return ResultOk;
 }
 

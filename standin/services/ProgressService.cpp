@@ -49,8 +49,7 @@ int32 ProgressService::setRange(uint64 total)
 {
     if (!m_operation)
         return ResultFalse;
-    m_operation->total = total;
-    m_operation->position = 0;
+    m_operation->beginStage(total);
     report();
     return ResultOk;
 }
@@ -114,11 +113,19 @@ ProgressService::Operation::Operation(const char16_t* operationTitle, bool* oper
 {
 }
 
+void ProgressService::Operation::beginStage(uint64 steps)
+{
+    stageStart = total > 0 ? percentage() : 0;
+    total = steps;
+    position = 0;
+}
+
 int ProgressService::Operation::percentage() const
 {
-    if (position == total)
+    if (position == total && total > 0)
         return 100;
-    return std::min(99, static_cast<int>(100.0 * static_cast<double>(position) / static_cast<double>(total)));
+    const double part = total > 0 ? static_cast<double>(position) / static_cast<double>(total) : 0.0;
+    return std::max(stageStart, std::min(99, stageStart + static_cast<int>((100 - stageStart) * part)));
 }
 
 std::u16string ProgressService::Operation::line() const

@@ -15,6 +15,8 @@ namespace standin {
 ///
 ///     Cadrel:  45% (123 of 270) Processing Project - Generate Markers
 ///
+/// How many stages there will be isn't known, so that each takes what the former ones have left of the hundred.
+///
 /// The user cancels by interrupting the program: whatever the operation tells of its progress asks for that. All but
 /// `begin` is refused while no operation has begun.
 class ProgressService : public Velmark::Implements<ProgressService, Velmark::FObject, Velmark::IProgressService> {
@@ -39,6 +41,7 @@ private:
     struct Operation {
         Operation(const char16_t* operationTitle, bool* operationCancelled);
 
+        void beginStage(Velmark::uint64 steps);
         int percentage() const;
         std::u16string line() const;
 
@@ -47,6 +50,7 @@ private:
         std::u16string status;
         Velmark::uint64 total = 0; ///< 0 before a stage has begun
         Velmark::uint64 position = 0;
+        int stageStart = 0; ///< the percentage at which the stage began
         bool* cancelled = nullptr;
         bool isVisible = false;
     };

@@ -42,7 +42,7 @@ void Terminal::drawProgress(const std::u16string& text)
     if (!m_out || !m_canRedraw)
         return;
     std::wstring shown = HostString(text).wide();
-    shown.resize(std::min(shown.size(), LineLength));
+    shown.resize(std::min(shown.size(), m_lineLength));
     std::replace_if(
         shown.begin(), shown.end(), [](wchar_t character) { return !isPrintable(static_cast<char32_t>(character)); },
         L'?');

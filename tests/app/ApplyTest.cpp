@@ -8,6 +8,7 @@
 #include <algorithm>
 #include <array>
 #include <cstddef>
+#include <cstdint>
 #include <cstdio>
 #include <filesystem>
 #include <gtest/gtest.h>
@@ -16,6 +17,7 @@
 #include <stdexcept>
 #include <string_view>
 #include <sys/resource.h>
+#include <utility>
 
 namespace {
 
@@ -303,6 +305,9 @@ New cut     new.edl: 4 events, all valid
 Frame rate  24 fps, as the project has it
 Change EDL  2 events
 Covered     00:00:28:00 of 00:00:32:00, 87.5 %
+Settings    default       --tracks all --match roll --heal normal --vfx none --no-overhang --overhang-percent 50
+                          --remains 5 --no-virgin-territories --no-preserve --destination-markers --insert-markers
+                          --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll
 Applied     2 events
 Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 in no cut
 Own markers 3: 1 stay, 1 moved, 1 in no cut
@@ -605,7 +610,7 @@ TEST(Apply, VirginTerritoriesLeadTheAutomationOverWhatHasNoOldSound)
         const Scene scene(origin);
         const auto result = scene.folder / "result.stage";
         const auto volumeWith = [&](const std::string& option) {
-            EXPECT_EQ(scene.apply({"-o", result, option}).status, 0);
+            EXPECT_EQ(scene.apply({"-o", result, "--overwrite", option}).status, 0);
             const json shown = show(result);
             Words points;
             for (const json& point : named(shown.at("tracks"), "DIA").at("automation").at(0).at("points"))
@@ -619,6 +624,28 @@ TEST(Apply, VirginTerritoriesLeadTheAutomationOverWhatHasNoOldSound)
         EXPECT_EQ(volumeWith("--virgin-territories"), (Words{"11: 0.25", "14: 0.75", "18: 0.75", "22: 0.75"}));
         EXPECT_EQ(volumeWith("--no-virgin-territories"), (Words{"11: 0.25", "14: 0.75"}));
     }
+}
+
+TEST(Apply, VirginTerritoriesWriteTheNumbersThatStandInTheProject)
+{
+    const Scene scene;
+    std::string text = contentOf(scene.project);
+    for (const auto& [former, value] :
+         {std::pair{"\"value\": 0.25", "\"value\": 0.1"}, std::pair{"\"value\": 0.75", "\"value\": 0.7"}})
+        text.replace(text.find(former), std::string(former).size(), value);
+    writeFile(scene.project, text);
+    const auto result = scene.folder / "result.stage";
+
+    ASSERT_EQ(scene.apply({"-o", result, "--virgin-territories"}).status, 0);
+
+    std::size_t count = 0;
+    const json shown = show(result);
+    for (const json& point : named(shown.at("tracks"), "DIA").at("automation").at(0).at("points")) {
+        const double value = point.at("value");
+        EXPECT_TRUE(value == 0.1 || value == 0.7) << value;
+        ++count;
+    }
+    EXPECT_GE(count, 4U);
 }
 
 /// The value of a curve of `show` at a time in seconds behind 01:00:00:00, at which no point stands.
@@ -651,7 +678,7 @@ TEST(Apply, AFadeAtTheEndOfTheReelIsHeardInNoInsert)
     const auto oldFile = folder.write("old.edl", oldCut());
     const auto applied = [&](const std::string& newFile) {
         const Outcome outcome = runCadrel({"apply", project, "--old", oldFile, "--new", newFile, "--keep", "cut",
-                                           "--force", "-o", result, "--json", "-"});
+                                           "--force", "-o", result, "--overwrite", "--json", "-"});
         EXPECT_EQ(outcome.status, 0) << outcome.err;
         return json::parse(outcome.out);
     };
@@ -694,7 +721,8 @@ TEST(Apply, OutsideOfAPreservedStretchNothingChanges)
             scene.apply({"--preserve", "01:00:10:00", "01:00:20:00", "-o", result, "--json", "/dev/null"});
 
         EXPECT_EQ(outcome.status, 0) << outcome.err;
-        EXPECT_TRUE(tells(outcome.out, "Settings    between 01:00:10:00 and 01:00:20:00 alone\n")) << outcome.out;
+        EXPECT_TRUE(tells(outcome.out, "Settings    command line  --preserve 01:00:10:00 01:00:20:00\n"))
+            << outcome.out;
         EXPECT_TRUE(
             tells(outcome.out, "002  01:00:22:00  01:00:32:00  A003: lies outside of the stretch that may change\n"))
             << outcome.out;
@@ -721,6 +749,90 @@ TEST(Apply, APreservedStretchHasToBeOne)
     EXPECT_EQ(scene.apply({"--preserve", "-00:00:10:00", "01:00:20:00"}).status, 0);
 }
 
+/// The lines of a report that tell the settings, without their indentation.
+std::string settingsIn(const std::string& report)
+{
+    std::string lines;
+    const std::string title = "Settings    ";
+    for (std::size_t start = report.find(title); start != std::string::npos;) {
+        const std::size_t end = report.find('\n', start);
+        lines += report.substr(start + title.size(), end + 1 - start - title.size());
+        start =
+            report.compare(end + 1, title.size(), std::string(title.size(), ' ')) == 0 ? end + 1 : std::string::npos;
+    }
+    return lines;
+}
+
+TEST(Apply, TheReportTellsEachSettingAndWhereItIsFrom)
+{
+    const Scene scene;
+    const auto result = scene.folder / "result.stage";
+
+    EXPECT_EQ(
+        settingsIn(scene.apply({"--vfx", "V*_,", "--remains", "5", "-o", result}).out),
+        "command line  --vfx 'V*_,' --remains 5\n"
+        "default       --tracks all --match roll --heal normal --no-overhang --overhang-percent 50\n"
+        "              --no-virgin-territories --no-preserve --destination-markers --insert-markers\n"
+        "              --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll\n");
+
+    const Outcome later = runCadrel({"apply", result, "--change", scene.folder.write("change.edl", newCut()), "--force",
+                                     "--no-b-roll", "--overhang", "3", "--summary"});
+    // A change EDL that is there isn't made by the VFX patterns.
+    EXPECT_EQ(settingsIn(later.out),
+              "command line  --overhang 3 --no-b-roll\n"
+              "default       --tracks all --match roll --overhang-percent 50 --remains 5 --no-virgin-territories\n"
+              "              --no-preserve --destination-markers --insert-markers --dissolve-wipe-markers\n"
+              "              --automation-markers --snippet-markers --overlap-markers\n")
+        << later.err;
+}
+
+TEST(Apply, TheJsonTellsEachSettingAndWhereItIsFrom)
+{
+    const Scene scene;
+    const Words given{"--no-destination-markers",
+                      "--preserve",
+                      "01:00:00:00",
+                      "01:00:30:00",
+                      "--overhang",
+                      "3",
+                      "--no-overhang-percent",
+                      "--remains",
+                      "7",
+                      "--virgin-territories",
+                      "--tracks",
+                      "selected",
+                      "--match",
+                      "clip",
+                      "--no-b-roll",
+                      "--vfx",
+                      "A,B",
+                      "--vfx",
+                      "C,"};
+    const auto settingsOf = [&](const std::string& from) {
+        return json{{"tracks", {{"value", "selected"}, {"from", from}}},
+                    {"match", {{"value", "clip"}, {"from", from}}},
+                    {"heal", {{"value", "normal"}, {"from", "default"}}},
+                    {"vfx", {{"value", {"A,B", "C,"}}, {"from", from}}},
+                    {"overhang", {{"value", 3}, {"from", from}}},
+                    {"overhang-percent", {{"value", nullptr}, {"from", from}}},
+                    {"remains", {{"value", 7}, {"from", from}}},
+                    {"virgin-territories", {{"value", true}, {"from", from}}},
+                    {"preserve", {{"value", {"01:00:00:00", "01:00:30:00"}}, {"from", from}}},
+                    {"destination-markers", {{"value", false}, {"from", from}}},
+                    {"insert-markers", {{"value", true}, {"from", "default"}}},
+                    {"dissolve-wipe-markers", {{"value", true}, {"from", "default"}}},
+                    {"automation-markers", {{"value", true}, {"from", "default"}}},
+                    {"snippet-markers", {{"value", true}, {"from", "default"}}},
+                    {"overlap-markers", {{"value", true}, {"from", "default"}}},
+                    {"b-roll", {{"value", false}, {"from", from}}}};
+    };
+    Words inPlace = given;
+    inPlace.emplace_back("--in-place");
+
+    EXPECT_EQ(scene.applyAsJson(inPlace).at("settings"), settingsOf("command line"));
+    EXPECT_EQ(scene.applyAsJson({"--force"}).at("settings"), settingsOf("project"));
+}
+
 TEST(Apply, WhatIsNotGivenIsAsInTheLastRun)
 {
     const Scene scene;
@@ -728,26 +840,45 @@ TEST(Apply, WhatIsNotGivenIsAsInTheLastRun)
     ASSERT_EQ(scene
                   .apply({"-o", result, "--no-destination-markers", "--preserve", "01:00:00:00", "01:00:30:00",
                           "--overhang", "3", "--remains", "7", "--virgin-territories", "--tracks", "selected",
-                          "--match", "clip", "--no-b-roll"})
+                          "--match", "clip", "--no-b-roll", "--vfx", "A,B"})
                   .status,
               0);
-    const auto settingsWith = [&](const Words& more) {
+    const auto projectsWith = [&](const Words& more) {
         Words words{"apply", result, "--old", scene.oldFile, "--new", scene.newFile, "--summary", "--force"};
         words.insert(words.end(), more.begin(), more.end());
         const Outcome outcome = runCadrel(words);
         EXPECT_EQ(outcome.status, 0) << outcome.err;
-        const std::size_t start = outcome.out.find("Settings    ");
-        return start == std::string::npos ? std::string()
-                                          : outcome.out.substr(start + 12, outcome.out.find('\n', start) - start - 12);
+        const std::size_t start = outcome.out.find("project       ");
+        return start == std::string::npos
+                   ? std::string()
+                   : outcome.out.substr(start + 14, outcome.out.find("default", start) - start - 14);
     };
 
+    EXPECT_EQ(projectsWith({}),
+              "--tracks selected --match clip --vfx A,B --overhang 3 --remains 7 --virgin-territories\n"
+              "                          --preserve 01:00:00:00 01:00:30:00 "
+              "--no-destination-markers --no-b-roll\n            ");
     EXPECT_EQ(
-        settingsWith({}),
-        "selected tracks alone, matched by clip name, overhangs up to 3 frames go along, snippets up to 7 frames, "
-        "virgin territories, between 01:00:00:00 and 01:00:30:00 alone, no destination markers, no B-rolls");
-    EXPECT_EQ(settingsWith({"--destination-markers", "--no-preserve", "--no-overhang", "--remains", "5",
-                            "--no-virgin-territories", "--tracks", "all", "--match", "roll", "--b-roll"}),
-              "");
+        projectsWith({"--destination-markers", "--no-preserve", "--no-overhang", "--remains", "5",
+                      "--no-virgin-territories", "--tracks", "all", "--match", "roll", "--b-roll", "--vfx", "none"}),
+        "");
+    EXPECT_EQ(projectsWith({"--fresh"}), "");
+}
+
+TEST(Apply, NoneForgetsTheVfxPatterns)
+{
+    const Scene scene;
+    const auto patternsWith = [&](const Words& options) {
+        return scene.applyAsJson(options).at("settings").at("vfx").at("value");
+    };
+
+    EXPECT_EQ(patternsWith({"--vfx", "A,", "--in-place"}), json::array({"A,"}));
+    EXPECT_EQ(patternsWith({"--force"}), json::array({"A,"}));
+    EXPECT_EQ(patternsWith({"--force", "--vfx", "none", "--in-place"}), json::array());
+    EXPECT_EQ(patternsWith({"--force"}), json::array());
+    const Outcome both = scene.apply({"--vfx", "none", "--vfx", "A,"});
+    EXPECT_EQ(both.status, 2);
+    EXPECT_EQ(both.err, "cadrel: --vfx: give none alone; see --help\n");
 }
 
 TEST(Apply, ASecondRunPutsItsMarkersInThePlaceOfThoseOfTheFirst)
@@ -870,21 +1001,94 @@ TEST(Apply, NoRunIsQuadraticInClipsOfOneTake)
     }
 }
 
-TEST(Apply, ABrokenModelIsToldOfAndReplaced)
+/// Puts another block into a project that a run has stored one in; a checksum that fits it goes along.
+void replaceStored(const std::string& project, const std::string& base64, std::uint32_t checksum)
+{
+    json document = json::parse(contentOf(project));
+    document.at("attributes").at("CaDr").at("CaDrData") = base64;
+    document.at("attributes").at("CaDs") = checksum;
+    writeFile(project, document.dump());
+}
+
+TEST(Apply, ABrokenModelStopsTheRunUnlessItIsToBeginAnew)
 {
     const Scene scene;
-    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+    ASSERT_EQ(scene.apply({"--in-place", "--vfx", "A,", "--match", "clip"}).status, 0);
     std::string text = contentOf(scene.project);
     const std::size_t checksum = text.find("\"CaDs\": ") + 8;
     text.replace(checksum, text.find_first_of(",\n", checksum) - checksum, std::string("1"));
     writeFile(scene.project, text);
 
-    const Outcome outcome = scene.apply({"--in-place"});
+    const Outcome outcome = scene.apply({"--in-place", "--force"});
 
-    EXPECT_EQ(outcome.status, 0);
-    EXPECT_TRUE(tells(outcome.err, "An error occurred while loading the Cadrel data. The data will be ignored."))
-        << outcome.err;
-    EXPECT_EQ(scene.apply({"--force"}).err, "");
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err, "cadrel: " + scene.project +
+                               ": Cadrel's data in it is damaged: its checksum doesn't fit; "
+                               "take an intact copy, or begin anew with --fresh\n");
+    EXPECT_EQ(contentOf(scene.project), text);
+
+    const Outcome fresh = scene.apply({"--in-place", "--fresh"});
+    EXPECT_EQ(fresh.status, 0);
+    EXPECT_EQ(fresh.err, "");
+    EXPECT_FALSE(tells(fresh.out, "project       ")) << fresh.out;
+    EXPECT_EQ(scene.apply({"--force"}).status, 0);
+}
+
+TEST(Apply, AModelOfANewerVersionIsNeverOverwrittenInPlace)
+{
+    const Scene scene;
+    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+    // The bytes 02 00 00 00, which are the number of a version to come.
+    replaceStored(scene.project, "AgAAAA==", 0x8b4d1797);
+    const std::string before = contentOf(scene.project);
+    const auto result = scene.folder / "result.stage";
+
+    const Outcome stopped = scene.apply({"-o", result});
+    EXPECT_EQ(stopped.status, 1);
+    EXPECT_EQ(stopped.err, "cadrel: " + scene.project +
+                               ": Cadrel's data in it was written by a newer version; "
+                               "use the version that wrote it, or begin anew with --fresh\n");
+    const Outcome inPlace = scene.apply({"--in-place", "--fresh", "--force"});
+    EXPECT_EQ(inPlace.status, 1);
+    EXPECT_EQ(inPlace.err, "cadrel: " + scene.project +
+                               ": Cadrel's data in it was written by a newer version, and is kept; "
+                               "give -o to write the project elsewhere\n");
+    EXPECT_EQ(contentOf(scene.project), before);
+    EXPECT_FALSE(std::filesystem::exists(result));
+    EXPECT_EQ(scene.apply({"-o", result, "--fresh"}).status, 0);
+    EXPECT_EQ(show(result).at("lastRun").at("old").at("events"), 3);
+}
+
+TEST(Apply, BeginningAnewForgetsTheLastCut)
+{
+    const Scene scene;
+    ASSERT_EQ(scene.apply({"--in-place"}).status, 0);
+
+    EXPECT_TRUE(tells(scene.apply().err, "--force")) << scene.apply().err;
+    EXPECT_EQ(scene.apply({"--fresh"}).status, 0);
+}
+
+TEST(Apply, AClipDecadesAfterTheFilmIsNamed)
+{
+    const Scene scene;
+    // 31 years of 365 days are 271,560 hours.
+    const std::string far = number(271560 * 3600.0);
+    const std::string later = number(271560 * 3600.0 + 1.0);
+    const auto failureOf = [&](const std::string& track) {
+        const std::string project = scene.folder.write("far.stage", projectWith(track));
+        const Outcome outcome =
+            runCadrel({"apply", project, "--old", scene.oldFile, "--new", scene.newFile, "--force"});
+        EXPECT_EQ(outcome.status, 1);
+        EXPECT_EQ(outcome.out, "");
+        return outcome.err.substr(std::string("cadrel: " + project + ": ").size());
+    };
+    const std::string near = R"({"kind": "clip", "start": 3611, "end": 3629, "name": "near"})";
+    const std::string remedy = ", too far off for a run; move it to its place, or remove it\n";
+
+    EXPECT_EQ(failureOf(R"({"kind": "audio", "name": "DIA", "events": [)" + near + R"(, {"kind": "clip", "start": )" +
+                        far + R"(, "end": )" + later + R"(, "name": "far"}]})"),
+              "the clip \"far\" on the track \"DIA\" stands at 271560:00:00:00" + remedy);
 }
 
 TEST(Apply, LinesThatCannotBeReadAreToldAndStrictWritesNothing)
@@ -1099,6 +1303,23 @@ TEST(Apply, OnATerminalTheProgressOfTheRunIsShown)
     EXPECT_EQ(scene.apply({"--summary"}).err, "");
 }
 
+TEST(Apply, TheProgressDoesntRunBack)
+{
+    const LongScene scene;
+
+    const std::string shown = runCadrelOnTerminal(scene.arguments({"--summary", "--virgin-territories"})).out;
+
+    int percent = 0;
+    std::size_t count = 0;
+    for (std::size_t at = shown.find("% ("); at != std::string::npos; at = shown.find("% (", at + 1)) {
+        const int next = std::stoi(shown.substr(at - 3, 3));
+        EXPECT_GE(next, percent) << shown.substr(at - 20, 60);
+        percent = next;
+        ++count;
+    }
+    EXPECT_GT(count, 10U);
+}
+
 TEST(Apply, AnInterruptionTakesTheRunBackAndLeavesTheFilesAsTheyWere)
 {
     const LongScene scene;
@@ -1113,6 +1334,104 @@ TEST(Apply, AnInterruptionTakesTheRunBackAndLeavesTheFilesAsTheyWere)
     EXPECT_EQ(contentOf(scene.project), before);
     EXPECT_EQ(contentOf(document), "former report");
     EXPECT_EQ(scene.folder.names(), (Words{"long.stage", "new.edl", "old.edl", "report.json"}));
+}
+
+TEST(Apply, WhatAnotherProgramSavesDuringTheRunIsNotOverwritten)
+{
+    const LongScene scene;
+    const std::string document = scene.folder / "report.json";
+    const auto run = [&](const Words& options) {
+        return runCadrelDisturbedAt("Processing Project", scene.arguments(options), [&] {
+            scene.folder.write("other", "of another program");
+            std::filesystem::rename(scene.folder / "other", scene.project);
+        });
+    };
+    const std::string project = contentOf(scene.project);
+    const std::string message =
+        ": another program has written it meanwhile; look at what it has written, and run again";
+
+    const Outcome outcome = run({"--in-place", "--backup", "--json", document});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(tells(outcome.out, scene.project + message)) << outcome.out;
+    EXPECT_EQ(contentOf(scene.project), "of another program");
+    EXPECT_EQ(scene.folder.names(), (Words{"long.stage", "new.edl", "old.edl"}));
+
+    // Beside it there is nothing to lose.
+    writeFile(scene.project, project);
+    EXPECT_EQ(run({"-o", scene.folder / "result.stage", "--summary"}).status, 0);
+}
+
+TEST(Apply, AFileThatComesUpDuringTheRunIsNotOverwritten)
+{
+    const LongScene scene;
+    const std::string result = scene.folder / "result.stage";
+    const auto run = [&](const Words& options) {
+        return runCadrelDisturbedAt("Processing Project", scene.arguments(options),
+                                    [&] { writeFile(result, "of another program"); });
+    };
+
+    const Outcome outcome = run({"-o", result, "--summary"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(tells(outcome.out, result + ": another program has written it meanwhile")) << outcome.out;
+    EXPECT_EQ(contentOf(result), "of another program");
+    EXPECT_EQ(run({"-o", result, "--overwrite", "--summary"}).status, 0);
+    EXPECT_NE(contentOf(result), "of another program");
+}
+
+TEST(Apply, AProjectThatExistsIsReplacedOnlyWhenThatIsSaid)
+{
+    const Scene scene;
+    const std::string result = scene.folder.write("result.stage", "former");
+
+    const Outcome outcome = scene.apply({"-o", result});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err, "cadrel: " + result + ": exists already; give --overwrite to replace it, or another name\n");
+    EXPECT_EQ(contentOf(result), "former");
+    EXPECT_EQ(scene.apply({"-o", result, "--overwrite"}).status, 0);
+    EXPECT_EQ(placesOn("Guide", result), (Places{{"guide", {"0-30"}}}));
+    EXPECT_EQ(scene.folder.names(), (Words{"new.edl", "old.edl", "result.stage", "scene.stage"}));
+}
+
+TEST(Apply, ABackupKeepsWhatIsReplacedUnderTheFirstFreeNumber)
+{
+    const Scene scene;
+    const std::string before = contentOf(scene.project);
+    const std::string first = scene.folder / "scene_backup_1.stage";
+    const std::string second = scene.folder / "scene_backup_2.stage";
+
+    const Outcome outcome = scene.apply({"--in-place", "--backup", "--summary"});
+
+    EXPECT_TRUE(outcome.out.ends_with("Written     " + scene.project + "\nBackup      " + first + "\n")) << outcome.out;
+    EXPECT_EQ(contentOf(first), before);
+    const std::string after = contentOf(scene.project);
+    EXPECT_NE(after, before);
+
+    std::filesystem::create_symlink("scene.stage", scene.folder / "link.stage");
+    const Outcome again = runCadrel({"apply", scene.folder / "link.stage", "--old", scene.oldFile, "--new",
+                                     scene.newFile, "--in-place", "--backup", "--force", "--json", "-"});
+
+    EXPECT_EQ(json::parse(again.out).at("backup"), second);
+    EXPECT_EQ(contentOf(first), before);
+    EXPECT_EQ(contentOf(second), after);
+    EXPECT_TRUE(std::filesystem::is_symlink(scene.folder / "link.stage"));
+    EXPECT_EQ(scene.applyAsJson({"--force", "--backup"}).at("backup"), json());
+    EXPECT_EQ(scene.folder.names(), (Words{"link.stage", "new.edl", "old.edl", "scene.stage", "scene_backup_1.stage",
+                                           "scene_backup_2.stage"}));
+}
+
+TEST(Apply, NothingIsPrintedOfAProjectThatCantBeWritten)
+{
+    const Scene scene;
+
+    const Outcome outcome = scene.apply({"-o", "/dev/full", "--json", "-"});
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.out, "");
+    EXPECT_EQ(outcome.err, "cadrel: /dev/full: can't be written; see whether the disk is full\n");
 }
 
 TEST(Apply, TheSoundOfAReelGoesOverToItsNewCut)

@@ -2,8 +2,11 @@
 
 #include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
+#include "tests/app/SoundProject.h"
+#include "tests/support/TreePaths.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <filesystem>
 #include <fstream>
 #include <functional>
@@ -11,6 +14,7 @@
 #include <nlohmann/json.hpp>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <utility>
 
 namespace {
 
@@ -167,6 +171,65 @@ TEST(BadInput, ALineOf100Megabytes)
     EXPECT_NE(outcome.out.find("A004  " + std::string(39, 'A') + "…  long.edl"), std::string::npos);
 }
 
+#if !defined(__SANITIZE_ADDRESS__) // whose memory can't be limited
+
+TEST(BadInput, LackOfMemoryIsToldAsWhatItIs)
+{
+    const TempFolder folder;
+    std::string text = "TITLE: LONG\n";
+    for (int index = 0; index < 40000; ++index)
+        text += cut("001", "A001", "10:00:00:00 10:00:00:12", "01:00:00:00 01:00:00:12");
+    const std::string file = folder.write("long.edl", text);
+    std::string events;
+    for (int index = 0; index < 40000; ++index)
+        events += std::string(index == 0 ? "" : ",") + R"({"kind": "clip", "start": )" + std::to_string(index) +
+                  R"(, "end": )" + std::to_string(index + 1) + "}";
+    const std::string project =
+        folder.write("long.stage", projectWith(R"({"kind": "audio", "name": "DIA", "events": [)" + events + "]}"));
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const auto runWith = [](std::size_t megabytes, std::vector<std::string> arguments) {
+        arguments.insert(arguments.begin(), {"--as=" + std::to_string(megabytes * 1024 * 1024), programPath("cadrel")});
+        return runProgram("prlimit", arguments);
+    };
+    std::size_t least = 16;
+    while (runWith(least, {"--version"}).status != 0)
+        least += 4;
+
+    for (const std::vector<std::string>& arguments :
+         {std::vector<std::string>{"list", file, "--rate", "24 fps", "--summary"},
+          {"apply", project, "--old", oldFile, "--new", newFile, "--force", "--summary"}}) {
+        std::size_t failures = 0;
+        for (std::size_t megabytes = least + 2;; megabytes += 4) {
+            const Outcome outcome = runWith(megabytes, arguments);
+            if (outcome.status == 0)
+                break;
+            ++failures;
+            ASSERT_EQ(outcome.status, 1) << megabytes << " MB for " << arguments.front();
+            EXPECT_EQ(outcome.err,
+                      "cadrel: memory: there is not enough of it; split the files or close other programs\n")
+                << megabytes << " MB for " << arguments.front();
+        }
+        EXPECT_GT(failures, 0U) << arguments.front();
+    }
+}
+
+#endif
+
+TEST(BadInput, AFileLargerThan256Megabytes)
+{
+    constexpr std::uintmax_t Largest = 256ULL * 1024 * 1024;
+    const TempFolder folder;
+    const std::string file = folder.write("picture.mxf", "");
+
+    // The holes of a file take no room on the disk.
+    std::filesystem::resize_file(file, Largest + 1);
+    expectRefused(file, "is larger than 256 MB, which no EDL is; give the CMX EDL of a picture track");
+
+    std::filesystem::resize_file(file, Largest);
+    expectStopped(runCadrel({"list", file}), file + ": holds no events; give a CMX EDL");
+}
+
 TEST(BadInput, NamesWithBlanksAndForeignLettersAreGood)
 {
     const TempFolder folder;
@@ -188,9 +251,9 @@ TEST(BadInput, AFileNameThatIsNoUtf8)
     const std::string good = folder.write("good.edl", oldCut());
 
     expectStopped(runCadrel({"list", file}),
-                  (folder / "caf?.edl").string() + ": the name is no UTF-8 text; rename the file or its folder");
+                  (folder / "caf\xc3\xa9.edl").string() + ": the name is no UTF-8 text; rename the file or its folder");
     expectStopped(runCadrel({"generate", "--old", good, "--new", good, "-o", folder / "caf\xe9"}),
-                  (folder / "caf?").string() + ": the name is no UTF-8 text; rename the file or its folder");
+                  (folder / "caf\xc3\xa9").string() + ": the name is no UTF-8 text; rename the file or its folder");
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"caf\xe9.edl", "good.edl"}));
 }
 
@@ -215,8 +278,8 @@ void expectUnwritable(const std::string& path, const std::string& problem, const
         return run(arguments);
     };
 
-    expectStopped(with({"-o", path}), path + ": " + problem);
-    expectStopped(with({"-o", path, "--json", folder / "change.json"}), path + ": " + problem);
+    expectStopped(with({"-o", path, "--overwrite"}), path + ": " + problem);
+    expectStopped(with({"-o", path, "--overwrite", "--json", folder / "change.json"}), path + ": " + problem);
     expectStopped(with({"-o", folder / "change.edl", "--json", path}), path + ": " + problem);
     expectStopped(run({"list", oldFile, "--json", path}), path + ": " + problem);
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
@@ -310,6 +373,40 @@ TEST(BadOutput, TheFileOfASplitListThatCantBeWrittenIsNamed)
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"change_2.edl", "cut.edl"}));
 }
 
+TEST(BadOutput, AFileThatMayNotGrowAnyFurtherIsRemoved)
+{
+    const TempFolder folder;
+    std::string text;
+    for (int index = 0; index < 2000; ++index)
+        text += cut("001", "A001", "10:00:00:00 10:00:00:12", "01:00:00:00 01:00:00:12");
+    const std::string file = folder.write("long.edl", text);
+    const std::string document = folder / "long.json";
+
+    const Outcome outcome =
+        runProgram("prlimit", {"--fsize=100000", programPath("cadrel"), "list", file, "--json", document});
+
+    expectStopped(outcome, document + ": can't be written; see whether the disk is full, or give another name");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"long.edl"}));
+}
+
+TEST(BadOutput, TwoNamesOfOneFileAreTwoNamesAlsoWhereItDoesNotExist)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    std::filesystem::create_directory(folder / "sub");
+    std::filesystem::create_symlink("sub/target", folder / "link");
+    std::filesystem::create_symlink("link", folder / "other link");
+    for (const auto& [output, document] : {std::pair{"link", "sub/target"}, std::pair{"sub/target", "link"},
+                                           std::pair{"other link", "link"}, std::pair{"other link", "sub/./target"}}) {
+        const Outcome outcome = runCadrel(
+            {"generate", "--old", oldFile, "--new", oldFile, "-o", folder / output, "--json", folder / document});
+
+        EXPECT_EQ(outcome.status, 2) << output << document;
+        EXPECT_NE(outcome.err.find("would overwrite another file of this run"), std::string::npos) << outcome.err;
+    }
+    EXPECT_TRUE(std::filesystem::is_empty(folder / "sub"));
+}
+
 TEST(BadOutput, AnEmptyNameIsASlip)
 {
     const TempFolder folder;
@@ -328,8 +425,10 @@ TEST(BadOutput, AFormerFileStaysWhenTheRunFails)
     const std::string change = folder.write("change.edl", "former list");
     const std::string document = folder.write("change.json", "former document");
 
-    EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", change, "--json", "/dev/full"}).status,
-              1);
+    EXPECT_EQ(
+        runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", change, "--overwrite", "--json", "/dev/full"})
+            .status,
+        1);
     EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", "/dev/full", "--json", document}).status,
               1);
 
@@ -351,7 +450,8 @@ TEST(BadOutput, StandardOutputThatTakesNothing)
         runCadrel({"generate", "--old", oldFile, "--new", oldFile, "-o", folder / "change.edl", "--json", "-"},
                   "/dev/full"),
         line);
-    EXPECT_EQ(folder.names(), (std::vector<std::string>{"old.edl"}));
+    // Printing comes last, and what is completely written by then stays.
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.edl", "old.edl"}));
 }
 
 TEST(BadOutput, AFileCompletelyWrittenStaysWhenTheSummaryCantBeShown)
@@ -364,6 +464,46 @@ TEST(BadOutput, AFileCompletelyWrittenStaysWhenTheSummaryCantBeShown)
 
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.edl", "old.edl"}));
+}
+
+TEST(BadOutput, NothingIsPrintedOfAListThatCantBeWritten)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+
+    const Outcome outcome =
+        runCadrel({"generate", "--old", oldFile, "--new", oldFile, "-o", "/dev/full", "--json", "-"});
+
+    expectStopped(outcome, "/dev/full: can't be written; see whether the disk is full");
+}
+
+TEST(BadOutput, AFileThatExistsIsReplacedOnlyWhenThatIsSaid)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    for (const std::string command : {"generate", "notes"}) {
+        const std::string file = folder.write("result.txt", "former");
+        const std::vector<std::string> arguments{command, "--old", oldFile, "--new", newFile, "-o", file};
+
+        expectStopped(runCadrel(arguments), file + ": exists already; give --overwrite to replace it, or another name");
+        EXPECT_EQ(contentOf(file), "former");
+
+        std::vector<std::string> replacing = arguments;
+        replacing.emplace_back("--overwrite");
+        EXPECT_EQ(runCadrel(replacing).status, 0);
+        const std::string result = contentOf(file);
+        EXPECT_NE(result, "former");
+
+        replacing.emplace_back("--backup");
+        folder.write("result.txt", "former");
+        EXPECT_EQ(runCadrel(replacing).status, 0);
+        EXPECT_EQ(contentOf(file), result);
+        EXPECT_EQ(contentOf(folder / "result_backup_1.txt"), "former");
+        EXPECT_EQ(folder.names(),
+                  (std::vector<std::string>{"new.edl", "old.edl", "result.txt", "result_backup_1.txt"}));
+        std::filesystem::remove(folder / "result_backup_1.txt");
+    }
 }
 
 TEST(BadOutput, DevicesAreWrittenAndStay)

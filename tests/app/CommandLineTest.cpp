@@ -64,6 +64,29 @@ TEST(CommandLine, UnknownOptionsAreRefused)
     expectWrongUsage({"list", "old.edl", "--loud"}, "--loud");
 }
 
+TEST(CommandLine, AMistypedWordIsToldWithTheOneThatIsNear)
+{
+    const auto expectAdvice = [](const std::vector<std::string>& arguments, const std::string& line) {
+        const Outcome outcome = runCadrel(arguments);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.err, "cadrel: " + line + "\n");
+    };
+
+    expectAdvice({"aply"}, "there is no command aply; did you mean apply?");
+    expectAdvice({"lsit", "old.edl"}, "there is no command lsit; did you mean list?");
+    expectAdvice({"conform"}, "there is no command conform; see --help");
+    expectAdvice({"--hlp"}, "there is no option --hlp; did you mean --help?");
+    expectAdvice({"--versoin"}, "there is no option --versoin; did you mean --version?");
+    // What is missing, besides, is no reason not to tell.
+    expectAdvice({"apply", "--hlp"}, "there is no option --hlp; did you mean --help?");
+    expectAdvice({"apply", "a.stage", "--in-plac"}, "there is no option --in-plac; did you mean --in-place?");
+    expectAdvice({"generate", "--od=a.edl"}, "there is no option --od; did you mean --old?");
+    expectAdvice({"list", "old.edl", "--loud"}, "there is no option --loud; see --help");
+    // Three slips are too many.
+    expectAdvice({"show", "--trcaks"}, "there is no option --trcaks; did you mean --track?");
+    expectAdvice({"show", "--trcakss"}, "there is no option --trcakss; see --help");
+}
+
 TEST(CommandLine, WordsOfOptionsAreChecked)
 {
     const std::vector<std::string> files{"generate", "--old", "old.edl", "--new", "new.edl"};
@@ -154,6 +177,22 @@ TEST(CommandLine, TheProgressLineIsForTerminalsOnlyAndGoesAway)
 
     EXPECT_NE(onTerminal.out.find("reading old.edl\r\033[K"), std::string::npos) << onTerminal.out;
     EXPECT_EQ(runCadrel({"list", file}).err, "");
+}
+
+TEST(CommandLine, TheProgressLineDoesntWrapOnANarrowTerminal)
+{
+    const TempFolder folder;
+    const std::string file = folder.write("a rather long name.edl", oldCut());
+    const std::string cutAt19 = "reading a rather l\xe2\x80\xa6\r\033[K";
+    const auto shownOn = [&](unsigned short columns) {
+        return runCadrelOnNarrowTerminal({"list", file, "--summary"}, columns).out;
+    };
+
+    EXPECT_NE(shownOn(20).find(cutAt19), std::string::npos) << shownOn(20);
+    // "reading a rather long name.edl" has 30 columns, and a line that is filled to its last one may wrap.
+    EXPECT_EQ(shownOn(30).find("reading a rather long name.edl"), std::string::npos);
+    EXPECT_NE(shownOn(31).find("reading a rather long name.edl\r"), std::string::npos);
+    EXPECT_NE(shownOn(0).find("reading a rather long name.edl\r"), std::string::npos);
 }
 
 } // namespace

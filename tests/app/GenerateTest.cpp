@@ -283,6 +283,48 @@ TEST(Generate, TheFilesOfALongListDontOverwriteAnInputEither)
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"change_2.edl"}));
 }
 
+TEST(Generate, PartsOfAnEarlierLongerListStayAndAreNamed)
+{
+    const Film film(manyShots(1000), manyShots(1000));
+    const auto generate = [&](const std::string& heal) {
+        return film.generate({"-o", film.folder / "change.edl", "--overwrite", "--heal", heal});
+    };
+    const auto path = [&](const char* name) { return (film.folder / name).string(); };
+    film.folder.write("change_3.edl", "third");
+    film.folder.write("change_10.edl", "tenth");
+    for (const char* const other : {"change_.edl", "change_03.edl", "change_3b.edl", "change_3.txt", "rechange_3.edl"})
+        film.folder.write(other, "another");
+    const std::string remark = ", of an earlier list; remove what you don't need\n";
+
+    const std::string inTwo = generate("none").out;
+    EXPECT_TRUE(inTwo.ends_with("Left over   " + path("change_3.edl") + ", " + path("change_10.edl") + remark))
+        << inTwo;
+
+    // All shots stand where they stood, so that one event is left of them.
+    const std::string inOne = generate("normal").out;
+    EXPECT_TRUE(inOne.ends_with("Left over   " + path("change_1.edl") + ", " + path("change_2.edl") + ", " +
+                                path("change_3.edl") + ", " + path("change_10.edl") + remark))
+        << inOne;
+    const std::string inTwoAgain = generate("none").out;
+    EXPECT_TRUE(inTwoAgain.ends_with("Left over   " + path("change.edl") + ", " + path("change_3.edl") + ", " +
+                                     path("change_10.edl") + remark))
+        << inTwoAgain;
+    EXPECT_EQ(contentOf(path("change_3.edl")), "third");
+    EXPECT_EQ(contentOf(path("change_10.edl")), "tenth");
+}
+
+TEST(Generate, AnInputIsNoPartOfAnEarlierList)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("reel_1.edl", oldCut());
+    const std::string newFile = folder.write("reel_2.edl", newCut());
+
+    const Outcome outcome = runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", folder / "reel.edl"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(outcome.out.find("Left over"), std::string::npos) << outcome.out;
+}
+
 TEST(Generate, NothingThatSurvivesIsToldAndWritesNoFile)
 {
     const Film film(oldCut(), cut("001", "B009", "05:00:00:00 05:00:04:12", "01:00:00:00 01:00:04:12"));

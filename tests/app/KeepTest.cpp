@@ -2,13 +2,11 @@
 
 // What the picture didn't change stays: the laws of a run through the whole program.
 
-#include "standin/changes/ChangeLog.h"
-#include "standin/file/ProjectFile.h"
 #include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
+#include "tests/app/StoredProjects.h"
 #include "tests/support/TreePaths.h"
 #include "tests/support/core/TreeEdls.h"
-#include "tests/support/standin/RandomProject.h"
 
 #include <algorithm>
 #include <array>
@@ -103,20 +101,6 @@ bool tells(const std::string& text, const std::string& piece)
     return text.find(piece) != std::string::npos;
 }
 
-json tracksIn(const std::filesystem::path& project)
-{
-    return json::parse(contentOf(project)).at("tracks");
-}
-
-json trackIn(const std::filesystem::path& project, const std::string& name)
-{
-    for (const json& track : tracksIn(project)) {
-        if (track.at("name") == name)
-            return track;
-    }
-    return {};
-}
-
 /// "name start-end" of what lies on a track.
 Words placesOn(const std::string& track, const std::filesystem::path& project)
 {
@@ -140,7 +124,7 @@ struct Job {
 
     Outcome run(const Words& more = {}) const
     {
-        Words words{"apply", project, "--old", oldFile, "--new", newFile, "-o", result};
+        Words words{"apply", project, "--old", oldFile, "--new", newFile, "-o", result, "--overwrite"};
         words.insert(words.end(), more.begin(), more.end());
         return runCadrel(words);
     }
@@ -179,17 +163,6 @@ json soundOfThreeShots()
                                            clip("tail", Hour + 31, Hour + 33)})});
 }
 
-std::string randomText(std::uint64_t seed, const cadrel::core::Framerate& framerate)
-{
-    standin::ChangeLog log;
-    standin::tests::SeededChance chance(seed);
-    json project = json::parse(standin::ProjectFile::toText(*standin::tests::randomProject(chance, log)));
-    project["framesPerSecond"] = framerate.framesPerSecond;
-    project["dropFrame"] = framerate.dropFrame == 1;
-    project["pulledDown"] = framerate.pulledDown;
-    return project.dump();
-}
-
 TEST(Keep, EveryEdlOfTheTreeOntoItselfChangesNoTrackOfAnyProject)
 {
     const TempFolder folder;
@@ -200,7 +173,7 @@ TEST(Keep, EveryEdlOfTheTreeOntoItselfChangesNoTrackOfAnyProject)
         const TreeEdl edl(path);
         if (!edl.events().hasReadableEvent())
             continue;
-        const auto project = folder.write("random.stage", randomText(seed++, edl.framerate()));
+        const auto project = folder.write("random.stage", randomProjectText(seed++, edl.framerate()));
         const auto result = folder / "result.stage";
 
         const Outcome outcome = runCadrel({"apply", project, "--old", treePath(path), "--new", treePath(path),
@@ -224,34 +197,16 @@ TEST(Keep, ACutOntoItselfStoresTheModelAlone)
     for (std::uint64_t seed = 100; seed < 130; ++seed) {
         SCOPED_TRACE(seed);
         const Job job(threeShots(), threeShots(), json::array());
-        writeFile(job.project, randomText(seed, cadrel::core::Framerate(24, 0)));
+        writeFile(job.project, randomProjectText(seed, cadrel::core::Framerate(24, 0)));
 
-        const Outcome outcome = job.run({"--force"});
+        // A random project may hold what no run has stored.
+        const Outcome outcome = job.run({"--force", "--fresh"});
 
         ASSERT_EQ(outcome.status, 0) << outcome.err;
         EXPECT_TRUE(tells(outcome.out, "Applied     nothing, since no track has to change\n")) << outcome.out;
         EXPECT_EQ(tracksIn(job.result), tracksIn(job.project));
         EXPECT_NE(contentOf(job.result), contentOf(job.project));
     }
-}
-
-/// The value of a curve at a time, straight between its points.
-double valueAt(const json& points, double time)
-{
-    const json* before = nullptr;
-    for (const json& point : points) {
-        const double at = point.at("time");
-        if (at >= time) {
-            if (!before)
-                return point.at("value");
-            const double from = before->at("time");
-            const double share = at > from ? (time - from) / (at - from) : 1.0;
-            return before->at("value").get<double>() +
-                   share * (point.at("value").get<double>() - before->at("value").get<double>());
-        }
-        before = &point;
-    }
-    return before ? before->at("value").get<double>() : 0.0;
 }
 
 TEST(Keep, BeforeOneChangeNothingMovesAndAfterItEverythingByTheSame)
@@ -318,43 +273,94 @@ TEST(Keep, BeforeOneChangeNothingMovesAndAfterItEverythingByTheSame)
     }
 }
 
-/// The tracks of a project whose content a run may change, those in folders too; without those that runs write on.
-std::vector<json> changeableTracks(const json& tracks)
+/// A curve of those points, in seconds from the start of the film and values.
+json curveOf(const std::vector<std::pair<double, double>>& places)
 {
-    std::vector<json> found;
-    for (const json& track : tracks) {
-        if (track.at("kind") == "folder") {
-            for (const json& inner : changeableTracks(track.value("tracks", json::array())))
-                found.push_back(inner);
-        } else if (track.at("kind") != "ruler" && track.value("name", std::string()) != "Destination" &&
-                   track.value("name", std::string()) != "Insert") {
-            found.push_back(track);
+    json points = json::array();
+    for (const auto& [time, value] : places)
+        points.push_back({{"time", Hour + time}, {"value", value}});
+    return json::array({{{"number", 1}, {"automates", "volume"}, {"points", points}}});
+}
+
+const json& pointsOf(const json& track)
+{
+    return track["curves"][0]["points"];
+}
+
+/// Whether the curves of two tracks have the same value at those times, in seconds from the start of the film.
+void expectSameLevel(const json& was, double time, const json& now, double newTime)
+{
+    EXPECT_NEAR(valueAt(pointsOf(now), Hour + newTime), valueAt(pointsOf(was), Hour + time), 1e-6)
+        << time << " to " << newTime;
+}
+
+TEST(Keep, OverPictureThatWasReplacedTheAutomationKeepsTheLevelFromBefore)
+{
+    const Reel replaced = Reel(Hour).shot("A", 100, 10).shot("N", 50, 10).shot("C", 300, 10);
+    json sound = soundOfThreeShots();
+    sound[0]["curves"] = curveOf({{1, 0.25}, {8, 0.75}, {13, 0.5}, {25, 0.1}, {200, 0.9}});
+    const Job job(threeShots(), replaced, sound);
+
+    ASSERT_EQ(job.run().status, 0);
+
+    const json was = trackIn(job.project, "DIA");
+    const json now = trackIn(job.result, "DIA");
+    for (const double time : {0.0, 5.0, 9.9, 20.1, 24.0, 30.0, 150.0, 300.0})
+        expectSameLevel(was, time, now, time);
+    for (const double time : {10.1, 15.0, 19.9})
+        EXPECT_NEAR(valueAt(pointsOf(now), Hour + time), 0.65, 1e-6) << time;
+}
+
+TEST(Keep, OverGrownPictureTheAutomationKeepsTheLevelFromBefore)
+{
+    // B has lost its first two seconds, and four of a new shot stand before it.
+    const Reel grown = Reel(Hour).shot("A", 100, 10).shot("N", 50, 4).shot("B", 202, 8).shot("C", 300, 10);
+    json sound = soundOfThreeShots();
+    sound[0]["curves"] = curveOf({{9, 0.25}, {11, 0.75}, {13, 0.5}});
+    const Job job(threeShots(), grown, sound);
+
+    ASSERT_EQ(job.run().status, 0);
+
+    const json now = trackIn(job.result, "DIA");
+    for (const double time : {9.99, 10.01, 12.0, 13.99})
+        EXPECT_NEAR(valueAt(pointsOf(now), Hour + time), 0.5, 0.01) << time;
+    EXPECT_NEAR(valueAt(pointsOf(now), Hour + 14.01), 0.625, 0.01);
+    expectSameLevel(trackIn(job.project, "DIA"), 12.5, now, 14.5);
+}
+
+TEST(Keep, ACurveThatGoesOnBeyondTheChangeHasNoStrayPoints)
+{
+    const Reel lifted = Reel(Hour).shot("A", 100, 10).shot("C", 300, 10);
+    const Reel replaced = Reel(Hour).shot("A", 100, 10).shot("N", 50, 10).shot("C", 300, 10);
+    const std::vector<std::vector<std::pair<double, double>>> curves{
+        {{1, 0.25}, {8, 0.75}, {13, 0.5}, {25, 0.3}},
+        {{1, 0.1}, {25, 0.3}, {100, 0.7}},
+        {{200, 0.9}, {4000, 0.3}},
+        {{-3000, 0.2}, {-100, 0.6}},
+        {{8, 0.75}, {15, 0.75}, {15, 0.2}, {25, 0.1}, {80000, 0.7}}};
+    for (const Reel& changed : {withInsert(), lifted, replaced}) {
+        for (const auto& curve : curves) {
+            SCOPED_TRACE(testing::Message() << changed.text() << json(curve));
+            json sound = soundOfThreeShots();
+            sound[0]["curves"] = curveOf(curve);
+            const Job job(threeShots(), changed, sound);
+
+            ASSERT_EQ(job.run().status, 0);
+
+            const json was = pointsOf(trackIn(job.project, "DIA"));
+            const json now = pointsOf(trackIn(job.result, "DIA"));
+            for (const json& point : was) {
+                if (point.at("time") < Hour + 10 || point.at("time") > Hour + 100) {
+                    EXPECT_NE(std::find(now.begin(), now.end(), point), now.end()) << point;
+                }
+            }
+            for (const json& point : now) {
+                const double time = point.at("time");
+                const bool isChanged = Hour + 10 <= time && time <= Hour + 40;
+                EXPECT_TRUE(isChanged || std::find(was.begin(), was.end(), point) != was.end()) << point;
+            }
         }
     }
-    return found;
-}
-
-double endOf(const json& event)
-{
-    return event.value("end", event.at("start").get<double>());
-}
-
-/// Whether a list holds the event, as much later as `shift`; 0 means to the last bit.
-bool holds(const json& events, const json& event, double shift)
-{
-    const auto isSame = [&](const json& other) {
-        if (shift == 0.0)
-            return other == event;
-        json moved = other;
-        moved["start"] = event.at("start");
-        if (event.contains("end"))
-            moved["end"] = event.at("end");
-        constexpr double SameInstant = 1.0 / 384000;
-        return moved == event &&
-               std::abs(other.at("start").get<double>() - event.at("start").get<double>() - shift) < SameInstant &&
-               std::abs(endOf(other) - endOf(event) - shift) < SameInstant;
-    };
-    return std::any_of(events.begin(), events.end(), isSame);
 }
 
 TEST(Keep, InRandomProjectsOneChangeLeavesWhatIsBeforeItAndShiftsWhatIsAfter)
@@ -368,11 +374,11 @@ TEST(Keep, InRandomProjectsOneChangeLeavesWhatIsBeforeItAndShiftsWhatIsAfter)
     for (std::uint64_t seed = 200; seed < 320; ++seed) {
         SCOPED_TRACE(seed);
         const Job job(before, after, json::array());
-        json project = json::parse(randomText(seed, cadrel::core::Framerate(24, 0)));
+        json project = json::parse(randomProjectText(seed, cadrel::core::Framerate(24, 0)));
         project["timeOrigin"] = Hour;
         writeFile(job.project, project.dump());
 
-        const Outcome outcome = job.run({"--force"});
+        const Outcome outcome = job.run({"--force", "--fresh"});
 
         if (tells(outcome.err, "has no tracks that a run could change"))
             continue;
@@ -510,15 +516,28 @@ TEST(Keep, TheRangeThatTheUserPreservesIsStoredAndNotThatOfTheRun)
     const Job job(threeShots(), withInsert(), soundOfThreeShots());
 
     const Outcome without = job.run();
-    EXPECT_FALSE(tells(without.out, "alone")) << without.out;
+    EXPECT_TRUE(tells(without.out, "--no-preserve")) << without.out;
     const Outcome again = runCadrel({"apply", job.result, "--old", job.newFile, "--new", job.newFile});
-    EXPECT_FALSE(tells(again.out, "alone")) << again.out << again.err;
+    EXPECT_TRUE(tells(again.out, "--no-preserve")) << again.out << again.err;
 
     const Outcome with = job.run({"--preserve", "01:00:00:00", "01:00:20:00"});
-    EXPECT_TRUE(tells(with.out, "Settings    between 01:00:00:00 and 01:00:20:00 alone\n")) << with.out;
+    EXPECT_TRUE(tells(with.out, "Settings    command line  --preserve 01:00:00:00 01:00:20:00\n")) << with.out;
     // Up to 20 the run changes what has moved; "c" stays where it was.
     EXPECT_EQ(placesOn("DIA", job.result),
               (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3620", "c 3620-3630", "tail 3631-3633"}));
+}
+
+TEST(Keep, AChangeOutsideOfTheStretchThatMayChangeIsToldAsSuch)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+
+    const Outcome outcome = job.run({"--preserve", "01:00:00:00", "01:00:10:00"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_TRUE(tells(outcome.out,
+                      "Applied     nothing, since all that would change lies outside of the stretch that may change\n"))
+        << outcome.out;
+    EXPECT_EQ(tracksIn(job.result), tracksIn(job.project));
 }
 
 TEST(Keep, OutsideOfTheHullOfAGivenChangeEdlNothingIsTouched)
@@ -529,7 +548,7 @@ TEST(Keep, OutsideOfTheHullOfAGivenChangeEdlNothingIsTouched)
         "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:15:00 01:00:20:00", "01:00:10:00 01:00:15:00") +
                           cut("002", "B", "01:00:10:00 01:00:15:00", "01:00:15:00 01:00:20:00"));
 
-    const Outcome outcome = runCadrel({"apply", job.project, "--change", change, "-o", job.result});
+    const Outcome outcome = runCadrel({"apply", job.project, "--change", change, "-o", job.result, "--overwrite"});
 
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_EQ(placesOn("DIA", job.result),
@@ -545,16 +564,18 @@ TEST(Keep, WhatStandsInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
     const auto change = job.folder.write(
         "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:10:00 01:00:20:00", "01:00:14:00 01:00:24:00"));
 
-    const Outcome refused = runCadrel({"apply", job.project, "--change", change, "-o", job.result});
+    const Outcome refused = runCadrel({"apply", job.project, "--change", change, "-o", job.result, "--overwrite"});
 
     EXPECT_EQ(refused.status, 1);
     EXPECT_EQ(refused.err, "cadrel: " + change.string() +
                                ": 00:00:04:00 of sound or markers, from 01:00:20:00 on, stand where the change EDL "
                                "puts its stretches; make room for them, or give --force to let the cut win\n");
     EXPECT_FALSE(std::filesystem::exists(job.result));
-    const Outcome forced = runCadrel({"apply", job.project, "--change", change, "--force", "-o", job.result});
+    const Outcome forced =
+        runCadrel({"apply", job.project, "--change", change, "--force", "-o", job.result, "--overwrite"});
     EXPECT_EQ(forced.status, 0) << forced.err;
-    EXPECT_TRUE(tells(forced.out, "Lost        01:00:20:00 - 01:00:24:00, for want of room\n")) << forced.out;
+    EXPECT_TRUE(tells(forced.out, "Lost        01:00:20:00 - 01:00:24:00, which the change EDL carries nowhere\n"))
+        << forced.out;
     EXPECT_EQ(placesOn("DIA", job.result),
               (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3624", "c 3624-3630", "tail 3631-3633"}));
 }
@@ -637,13 +658,124 @@ void expectDoubt(const Job& job, const std::string& words)
     EXPECT_EQ(forced.status, 0) << forced.err;
 }
 
-TEST(Plausibility, TheSameRunTwiceIsRefused)
+/// Runs, and puts the result in the place of the project.
+void carryOver(const Job& job, const Words& words)
+{
+    Words all{"apply", job.project, "--in-place"};
+    all.insert(all.end(), words.begin(), words.end());
+    const Outcome outcome = runCadrel(all);
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+}
+
+void expectRefusedAgain(const Job& job, const Words& words, const std::string& why)
+{
+    Words all{"apply", job.project};
+    all.insert(all.end(), words.begin(), words.end());
+    const Outcome outcome = runCadrel(all);
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_TRUE(tells(outcome.err, why)) << outcome.err;
+    all.emplace_back("--force");
+    EXPECT_EQ(runCadrel(all).status, 0);
+}
+
+TEST(Plausibility, TheSameRunTwiceIsRefusedWhereverTheChangeIs)
+{
+    const Reel longer = threeShots().shot("D", 400, 10);
+    const Reel shorter = Reel(Hour).shot("A", 100, 10).shot("B", 200, 10);
+    const Reel trimmed = Reel(Hour).shot("A", 100, 10).shot("B", 200, 10).shot("C", 300, 9);
+    const Reel lifted = Reel(Hour).shot("A", 100, 10).at(Hour + 20).shot("C", 300, 10);
+    const Reel later = Reel(Hour + 2).shot("A", 102, 8).shot("B", 200, 10).shot("C", 300, 10);
+    const std::vector<std::pair<Reel, std::string>> changes{{withInsert(), "01:00:10:00"}, {longer, "01:00:30:00"},
+                                                            {shorter, "01:00:20:00"},      {trimmed, "01:00:29:00"},
+                                                            {lifted, "01:00:10:00"},       {later, "01:00:00:00"}};
+    for (const auto& [changed, place] : changes) {
+        SCOPED_TRACE(place);
+        const Job job(threeShots(), changed, soundOfThreeShots());
+        const Words words{"--old", job.oldFile, "--new", job.newFile};
+        carryOver(job, words);
+
+        expectRefusedAgain(
+            job, words, "was last carried over to another cut than the old one given; they differ first at " + place);
+    }
+}
+
+TEST(Plausibility, ReelOneAgainAfterReelTwoIsRefused)
 {
     const Job job(threeShots(), withInsert(), soundOfThreeShots());
-    ASSERT_EQ(job.run().status, 0);
-    std::filesystem::rename(job.result, job.project);
+    json project = json::parse(contentOf(job.project));
+    project["tracks"][0]["events"].push_back(clip("d", 2 * Hour, 2 * Hour + 20));
+    writeFile(job.project, project.dump());
+    const auto oldFile = job.folder.write("old2.edl", Reel(2 * Hour).shot("D", 400, 10).shot("E", 500, 10).text());
+    const auto newFile = job.folder.write("new2.edl", Reel(2 * Hour).shot("D", 400, 10).shot("E", 502, 8).text());
+    const auto next = job.folder.write("next.edl", Reel(Hour).shot("A", 100, 10).shot("N", 50, 4).text());
+    const Words first{"--old", job.oldFile, "--new", job.newFile};
+    const Words second{"--old", oldFile, "--new", newFile};
+    carryOver(job, first);
+    carryOver(job, second);
 
-    expectDoubt(job, "was last carried over to another cut than the old one given; they differ first at 01:00:10:00");
+    expectRefusedAgain(job, first, "they differ first at 01:00:10:00");
+    expectRefusedAgain(job, second, "they differ first at 02:00:10:00");
+    // From where it is now it goes on.
+    carryOver(job, {"--old", job.newFile, "--new", next, "--force"});
+    carryOver(job, {"--old", next, "--new", job.newFile});
+}
+
+TEST(Plausibility, APartOfTheCutThatTheProjectHasIsNoDoubt)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    carryOver(job, {"--old", job.oldFile, "--new", job.newFile});
+    const auto part = job.folder.write("part.edl", Reel(Hour + 14).shot("B", 200, 10).text());
+    const auto shorter = job.folder.write("shorter.edl", Reel(Hour + 14).shot("B", 200, 8).text());
+
+    carryOver(job, {"--old", part, "--new", shorter});
+}
+
+TEST(Plausibility, EventsThatAreFlawedCompareEqualWithThoseThatTheProjectStores)
+{
+    Reel flawed = threeShots();
+    const Job job(flawed, flawed, soundOfThreeShots());
+    writeFile(job.oldFile, flawed.text() + cut("004", "D", "xx:00:00:00 00:00:10:00", "01:00:30:00 01:00:35:00") +
+                               cut("005", "E", "00:00:99:00 00:01:00:00", "01:00:35:00 01:00:40:00"));
+    const Words words{"--old", job.oldFile, "--new", job.oldFile};
+    carryOver(job, words);
+
+    carryOver(job, words);
+}
+
+TEST(Plausibility, TheSameChangeEdlTwiceIsRefused)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    const auto change = job.folder.write(
+        "change.edl", "TITLE: CHANGE\n" + cut("001", "B", "01:00:15:00 01:00:20:00", "01:00:10:00 01:00:15:00") +
+                          cut("002", "B", "01:00:10:00 01:00:15:00", "01:00:15:00 01:00:20:00"));
+    const auto other = job.folder.write(
+        "other.edl", "TITLE: CHANGE\n" + cut("001", "C", "01:00:20:00 01:00:25:00", "01:00:25:00 01:00:30:00") +
+                         cut("002", "C", "01:00:25:00 01:00:30:00", "01:00:20:00 01:00:25:00"));
+    const std::string why = "has been carried out in the project already";
+    carryOver(job, {"--change", change});
+
+    expectRefusedAgain(job, {"--change", change}, why);
+    carryOver(job, {"--change", other});
+    expectRefusedAgain(job, {"--change", change}, why);
+    expectRefusedAgain(job, {"--change", other}, why);
+}
+
+TEST(Plausibility, TheChangeEdlOfTwoCutsAndTheCutsThemselvesAreTheSameRun)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    const std::string change = job.folder / "change.edl";
+    const Words cuts{"--old", job.oldFile, "--new", job.newFile};
+    Words generate{"generate", "--rate", "24 fps", "-o", change};
+    generate.insert(generate.end(), cuts.begin(), cuts.end());
+    ASSERT_EQ(runCadrel(generate).status, 0);
+    const std::string untouched = contentOf(job.project);
+    const std::string why = "has been carried out in the project already";
+
+    carryOver(job, cuts);
+    expectRefusedAgain(job, {"--change", change}, why);
+    writeFile(job.project, untouched);
+    carryOver(job, {"--change", change, "--force"});
+    expectRefusedAgain(job, cuts, why);
 }
 
 TEST(Plausibility, ReelTwoAfterReelOneIsNoDoubt)
@@ -737,8 +869,8 @@ TEST(Shift, FilesOfOneCutOnTheSameTimecodeAreRefusedWithTheShiftThatPartsThem)
 
     EXPECT_EQ(refused.status, 1);
     EXPECT_EQ(refused.err, "cadrel: " + reels.second +
-                               ": lies on the same timecode as another file of its cut; give --shift "
-                               "r2.edl=+01:00:00:00\n");
+                               ": lies on the same timecode as another file of its cut; give --shift " + reels.second +
+                               "=+01:00:00:00\n");
     words.insert(words.end(), {"--shift", "r2.edl=+01:00:00:00"});
     const Outcome parted = runCadrel(words);
     EXPECT_EQ(parted.status, 0) << parted.err;
@@ -754,7 +886,33 @@ TEST(Shift, AtTheEndOfTheDayFilesArePartedBackwards)
     const Outcome outcome = runCadrel({"generate", "--rate", "24 fps", "--old", first, second, "--new", first});
 
     EXPECT_EQ(outcome.status, 0);
-    EXPECT_TRUE(tells(outcome.err, "give --shift r2.edl=-01:00:00:00")) << outcome.err;
+    EXPECT_TRUE(tells(outcome.err, "give --shift " + second.string() + "=-01:00:00:00")) << outcome.err;
+}
+
+TEST(Shift, FilesOfOneNameOnBothSidesArePartedByTheirPaths)
+{
+    const TempFolder folder;
+    const std::string first = Reel(Hour).shot("A", 100, 10).text();
+    const std::string second = Reel(Hour).shot("B", 100, 10).text();
+    Words words{"generate", "--rate", "24 fps", "-o", folder / "change.edl"};
+    Words shifts;
+    for (const char* side : {"old", "new"}) {
+        std::filesystem::create_directory(folder / side);
+        const std::string name = folder / side;
+        writeFile(name + "/r1.edl", first);
+        writeFile(name + "/r2.edl", second);
+        words.insert(words.end(), {std::string("--") + side, name + "/r1.edl", name + "/r2.edl"});
+        shifts.insert(shifts.end(), {"--shift", name + "/r2.edl=+01:00:00:00"});
+    }
+
+    const Outcome warned = runCadrel(words);
+    for (const std::size_t index : {1U, 3U})
+        EXPECT_TRUE(tells(warned.err, "give --shift " + shifts[index] + "\n")) << warned.err;
+    words.insert(words.end(), shifts.begin(), shifts.end());
+    const Outcome parted = runCadrel(words);
+
+    EXPECT_EQ(parted.status, 0);
+    EXPECT_EQ(parted.err, "");
 }
 
 TEST(Shift, MovesTheTimecodesOfItsFileAloneInEveryCommand)

@@ -259,14 +259,14 @@ TEST(List, NamesThatControlTheTerminalAreShownHarmless)
     EXPECT_EQ(event.at("clip"), "\033[31mRED\007 M\xc3\xbcller \xc2\x9b \xe2\x80\xae");
 }
 
-TEST(List, BytesThatAreNoUtf8AreReplacedInTheJson)
+TEST(List, BytesThatAreNoUtf8AreLatin1OnTheScreenAndReplacedInTheJson)
 {
     const TempFolder folder;
     const std::string file = folder.write(
         "film.edl", cut("001", "A001", "10:00:00:00 10:00:04:12", "01:00:00:00 01:00:04:12") + clipName("CAF\xc9 2"));
 
     EXPECT_EQ(listAsJson({file}).at("events").at(0).at("clip"), "CAF\xef\xbf\xbd 2");
-    EXPECT_NE(runCadrel({"list", file}).out.find("CAF? 2"), std::string::npos);
+    EXPECT_NE(runCadrel({"list", file}).out.find("CAF\xc3\x89 2"), std::string::npos);
 }
 
 TEST(List, LongNamesAreCutInTheTableAlone)
@@ -297,6 +297,70 @@ TEST(List, UnreadableTimecodesAndTheirSpeedAreLeftOpen)
                                "range   003"),
               std::string::npos)
         << outcome.out;
+}
+
+TEST(List, NamesTakeTheColumnsThatATerminalGivesThem)
+{
+    const TempFolder folder;
+    // Two characters of two columns each; "e" with an accent over it of its own; Latin-1, of one column a letter.
+    const std::string file =
+        folder.write("film.edl", cut("001", "A001", "10:00:00:00 10:00:04:00", "01:00:00:00 01:00:04:00") +
+                                     clipName("\xe6\x97\xa5\xe6\x9c\xac") +
+                                     cut("002", "A002", "10:00:00:00 10:00:04:00", "01:00:04:00 01:00:08:00") +
+                                     clipName("cafe\xcc\x81 x") +
+                                     cut("003", "A003", "10:00:00:00 10:00:04:00", "01:00:08:00 01:00:12:00") +
+                                     clipName("M\xfc"
+                                              "nchen"));
+
+    const std::string shown = runCadrel({"list", file, "--rate", "24 fps"}).out;
+
+    EXPECT_TRUE(shown.starts_with("state  event  roll  clip     file      trans"
+                                  "  src in       src out      dst in       dst out      speed\n"
+                                  "ok     001    A001  \xe6\x97\xa5\xe6\x9c\xac     film.edl  C    ") &&
+                shown.find("ok     002    A002  cafe\xcc\x81 x   film.edl  C    ") != std::string::npos &&
+                shown.find("ok     003    A003  M\xc3\xbcnchen  film.edl  C    ") != std::string::npos)
+        << shown;
+}
+
+TEST(List, ALongNameIsCutByColumns)
+{
+    const TempFolder folder;
+    const auto clipOf = [&](const std::string& name) {
+        const std::string file = folder.write(
+            "film.edl", cut("001", "A001", "10:00:00:00 10:00:04:00", "01:00:00:00 01:00:04:00") + clipName(name));
+        const std::string shown = runCadrel({"list", file, "--rate", "24 fps"}).out;
+        const std::size_t start = shown.find("A001  ") + 6;
+        return shown.substr(start, shown.find("  film.edl", start) - start);
+    };
+    const auto times = [](int count, const std::string& text) {
+        std::string all;
+        for (int index = 0; index < count; ++index)
+            all += text;
+        return all;
+    };
+    const std::string wide = "\xe6\x97\xa5";
+    const std::string accented = "e\xcc\x81";
+    const std::string dots = "\xe2\x80\xa6";
+
+    EXPECT_EQ(clipOf(times(20, wide)), times(20, wide));
+    EXPECT_EQ(clipOf(times(21, wide)), times(19, wide) + dots);
+    EXPECT_EQ(clipOf(std::string("x").append(times(20, wide))), std::string("x").append(times(19, wide)) + dots);
+    EXPECT_EQ(clipOf(times(40, accented)), times(40, accented));
+    EXPECT_EQ(clipOf(times(41, accented)), times(39, accented) + dots);
+}
+
+TEST(List, DropFrameShowsInASemicolonOnTheScreenAlone)
+{
+    const TempFolder folder;
+    const std::string file = folder.write(
+        "film.edl", "FCM: DROP FRAME\n" + cut("001", "A001", "10:00:00:00 10:01:00:02", "01:00:00:00 01:01:00:02"));
+
+    const std::string shown = runCadrel({"list", file, "--rate", "29.97 dfps"}).out;
+
+    EXPECT_NE(shown.find("10:00:00;00  10:01:00;02  01:00:00;00  01:01:00;02"), std::string::npos) << shown;
+    EXPECT_NE(shown.find("Programme   01:00:00;00 - 01:01:00;02, 00:01:00;02 long\n"), std::string::npos) << shown;
+    EXPECT_EQ(listAsJson({file, "--rate", "29.97 dfps"}).at("events").at(0).at("dstOut"), "01:01:00:02");
+    EXPECT_EQ(runCadrel({"list", file, "--rate", "30 fps"}).out.find(';'), std::string::npos);
 }
 
 } // namespace

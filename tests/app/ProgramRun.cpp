@@ -13,6 +13,7 @@
 #include <sched.h>
 #include <spawn.h>
 #include <stdexcept>
+#include <sys/ioctl.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -91,13 +92,19 @@ Outcome run(const std::vector<std::string>& words, const std::string& outPath)
     return {status, outPath.empty() ? contentOf(out) : std::string(), contentOf(err)};
 }
 
-/// `whenShown` is called with all that the program has shown so far, whenever that has become more.
+/// `whenShown` is called with all that the program has shown so far, whenever that has become more. 0 columns stand for a
+/// terminal that doesn't tell how many it has.
 Outcome runOnTerminal(const std::vector<std::string>& arguments, const std::string& environment,
-                      const std::function<void(pid_t child, const std::string& shown)>& whenShown)
+                      const std::function<void(pid_t child, const std::string& shown)>& whenShown,
+                      unsigned short columns = 0)
 {
     const int terminal = posix_openpt(O_RDWR | O_NOCTTY);
     if (terminal < 0 || grantpt(terminal) != 0 || unlockpt(terminal) != 0)
         throw std::runtime_error("no terminal");
+    winsize size{};
+    size.ws_col = columns;
+    if (ioctl(terminal, TIOCSWINSZ, &size) != 0)
+        throw std::runtime_error("a terminal without a width");
     Outputs outputs;
     outputs.open(STDOUT_FILENO, ptsname(terminal));
     outputs.open(STDERR_FILENO, ptsname(terminal));
@@ -114,6 +121,19 @@ Outcome runOnTerminal(const std::vector<std::string>& arguments, const std::stri
     close(terminal);
 
     return {exitStatusOf(child), shown, {}};
+}
+
+/// `act` is called once, as soon as the text is shown.
+Outcome runOnTerminalUntil(const std::string& text, const std::vector<std::string>& arguments,
+                           const std::function<void(pid_t child)>& act)
+{
+    bool isDone = false;
+    return runOnTerminal(arguments, {}, [&](pid_t child, const std::string& shown) {
+        if (isDone || shown.find(text) == std::string::npos)
+            return;
+        act(child);
+        isDone = true;
+    });
 }
 
 constexpr uid_t Nobody = 65534;
@@ -184,15 +204,21 @@ Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std
     return runOnTerminal(arguments, environment, [](pid_t, const std::string&) {});
 }
 
+Outcome runCadrelOnNarrowTerminal(const std::vector<std::string>& arguments, unsigned short columns)
+{
+    return runOnTerminal(
+        arguments, {}, [](pid_t, const std::string&) {}, columns);
+}
+
 Outcome runCadrelInterruptedAt(const std::string& text, const std::vector<std::string>& arguments)
 {
-    bool isInterrupted = false;
-    return runOnTerminal(arguments, {}, [&](pid_t child, const std::string& shown) {
-        if (isInterrupted || shown.find(text) == std::string::npos)
-            return;
-        kill(child, SIGINT);
-        isInterrupted = true;
-    });
+    return runOnTerminalUntil(text, arguments, [](pid_t child) { kill(child, SIGINT); });
+}
+
+Outcome runCadrelDisturbedAt(const std::string& text, const std::vector<std::string>& arguments,
+                             const std::function<void()>& disturb)
+{
+    return runOnTerminalUntil(text, arguments, [&](pid_t) { disturb(); });
 }
 
 } // namespace cadrel::tests

@@ -4,6 +4,7 @@
 
 #include "tests/support/TempFolder.h"
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -34,7 +35,12 @@ void giveToUnprivileged(const std::filesystem::path& path);
 /// Runs `cadrel` with both outputs on a terminal; what it showed stands in `out`. `environment` is added to what is
 /// set for the run, such as "NO_COLOR=1".
 Outcome runCadrelOnTerminal(const std::vector<std::string>& arguments, const std::string& environment = {});
+/// Likewise on one that has so many columns.
+Outcome runCadrelOnNarrowTerminal(const std::vector<std::string>& arguments, unsigned short columns);
 /// Likewise, and interrupts it, as Ctrl-C does, as soon as it shows the text.
 Outcome runCadrelInterruptedAt(const std::string& text, const std::vector<std::string>& arguments);
+/// Likewise, but does something else once it shows the text.
+Outcome runCadrelDisturbedAt(const std::string& text, const std::vector<std::string>& arguments,
+                             const std::function<void()>& disturb);
 
 } // namespace cadrel::tests

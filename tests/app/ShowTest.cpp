@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/SoundProject.h"
 
@@ -68,10 +69,10 @@ TEST(Show, PrintsTheFactsTheTreeTheContentAndThePool)
         "  clip    01:00:03:00.25  01:00:04:00  00:00:00:23.75  step    feet  00:00:00:00\n"
         "\n"
         "Memos (marker)\n"
-        "  Cadrel:MarkerType 7\n"
+        "  Cadrel's track: Memos\n"
         "  kind    in              out          length          name\n"
         "  marker  01:00:01:00                                  too loud\n"
-        "    CadrEventUserId 3, User:STR_MAReel \"A012C004\"\n"
+        "    reel A012C004\n"
         "  range   01:00:03:00     01:00:04:00  00:00:01:00     listen to this one again with the director present\n"
         "\n"
         "clip  kind   length       file\n"
@@ -264,7 +265,7 @@ TEST(Show, TheFrameRateIsNamedWithItsDropFrameAndPullDown)
 TEST(Show, DropFrameLeavesOutTheFirstTwoNumbersOfAMinute)
 {
     // 1800 frames at 30 a second.
-    EXPECT_EQ(factOf(projectAt(30, true, true, 60), "Time origin"), "Time origin  00:01:00:02");
+    EXPECT_EQ(factOf(projectAt(30, true, true, 60), "Time origin"), "Time origin  00:01:00;02");
     EXPECT_EQ(factOf(projectAt(30, false, true, 60), "Time origin"), "Time origin  00:01:00:00");
 }
 
@@ -274,7 +275,7 @@ TEST(Show, TheHoursCountOnBehindADayAndWhatLiesBeforeMidnightHasAMinus)
     EXPECT_EQ(factOf(projectAt(24, false, false, -0.5), "Time origin"), "Time origin  -00:00:00:12");
     EXPECT_EQ(factOf(projectAt(25, false, false, -1e-9), "Time origin"), "Time origin  00:00:00:00");
     EXPECT_EQ(factOf(projectAt(30, true, true, 86400.0 * 2589408 / 2592000), "Time origin"),
-              "Time origin  24:00:00:00");
+              "Time origin  24:00:00;00");
 }
 
 TEST(Show, WhatLiesBetweenFramesHasHundredthsBehindIt)
@@ -285,17 +286,76 @@ TEST(Show, WhatLiesBetweenFramesHasHundredthsBehindIt)
     EXPECT_EQ(factOf(projectAt(25, false, false, 10.996 * frame), "Time origin"), "Time origin  00:00:00:11");
 }
 
-TEST(Show, TheStoredListsOfAProjectAreShownWithTheirSizes)
+TEST(Show, AttributesOfOthersAreShownAsTheyAre)
+{
+    const TempFolder folder;
+    const std::string file = folder.write(
+        "stored.stage",
+        projectWith(R"({"kind": "marker", "name": "M", "attributes": {"Cadrel:MarkerType": 99, "Cadrel:LockState": 1}},
+                       {"kind": "video", "name": "V", "attributes": {"Cadrel:VideoType": 266, "Cadrel:LockState": 0}})",
+                    R"("attributes": {"Other": {"Data": "AAECAw=="}, "Number": 5},)"));
+
+    const std::string shown = runCadrel({"show", file}).out;
+
+    EXPECT_NE(shown.find("Attributes   Number 5\n"
+                         "             Other (Data of 4 bytes)\n"),
+              std::string::npos)
+        << shown;
+    EXPECT_NE(shown.find("M (marker)\n  held locked for a preview\n  Cadrel:MarkerType 99\n"), std::string::npos)
+        << shown;
+    // 266 is 256 and the role 10.
+    EXPECT_NE(shown.find("V (video)\n  Cadrel's track: Old Video, with a video of your own\n  empty\n"),
+              std::string::npos)
+        << shown;
+    EXPECT_EQ(showAsJson({file}).at("attributes"), json::parse(R"({"Other": {"Data": {"bytes": 4}}, "Number": 5})"));
+    EXPECT_EQ(showAsJson({file}).at("lastRun"), json());
+}
+
+TEST(Show, TheCutsAndSettingsOfTheLastRunAreShown)
+{
+    const TempFolder folder;
+    const std::string project = folder.write("scene.stage", soundProject());
+    const std::string result = folder / "result.stage";
+    ASSERT_EQ(runCadrel({"apply", project, "--old", folder.write("old.edl", oldCut()), "--new",
+                         folder.write("new.edl", newCut()), "--preserve", "01:00:00:00", "01:00:20:00", "-o", result,
+                         "--force"})
+                  .status,
+              0);
+
+    const std::string shown = runCadrel({"show", result}).out;
+    const json lastRun = showAsJson({result}).at("lastRun");
+
+    EXPECT_NE(shown.find("Old cut      old.edl: 3 events, all valid\n"
+                         "New cut      new.edl: 4 events, all valid\n"
+                         "Change EDL   1 event, all valid\n"),
+              std::string::npos)
+        << shown;
+    EXPECT_NE(shown.find("Settings     project       --preserve 01:00:00:00 01:00:20:00\n"
+                         "             default       --tracks all --match roll --heal normal --vfx none "),
+              std::string::npos)
+        << shown;
+    EXPECT_EQ(shown.find("CaDr"), std::string::npos) << shown;
+    EXPECT_EQ(lastRun.at("old"), (json{{"files", {"old.edl"}}, {"events", 3}, {"invalid", 0}}));
+    EXPECT_EQ(lastRun.at("new"), (json{{"files", {"new.edl"}}, {"events", 4}, {"invalid", 0}}));
+    EXPECT_EQ(lastRun.at("settings").at("preserve"),
+              (json{{"value", {"01:00:00:00", "01:00:20:00"}}, {"from", "project"}}));
+    EXPECT_EQ(lastRun.at("settings").size(), 16U);
+}
+
+TEST(Show, StoredDataThatCantBeReadIsTold)
 {
     const TempFolder folder;
     const std::string file = folder.write(
         "stored.stage", projectWith("", R"("attributes": {"CaDr": {"CaDrData": "AAECAw=="}, "CaDs": 5},)"));
 
-    EXPECT_NE(runCadrel({"show", file})
-                  .out.find("Attributes   CaDr (CaDrData of 4 bytes)\n"
-                            "             CaDs 5\n"),
-              std::string::npos);
-    EXPECT_EQ(showAsJson({file}).at("attributes"), json::parse(R"({"CaDr": {"CaDrData": {"bytes": 4}}, "CaDs": 5})"));
+    const Outcome outcome = runCadrel({"show", file});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_NE(outcome.out.find("Last run     Cadrel's data in it is damaged: its checksum doesn't fit\n"),
+              std::string::npos)
+        << outcome.out;
+    EXPECT_EQ(showAsJson({file}).at("lastRun"),
+              (json{{"unreadable", "Cadrel's data in it is damaged: its checksum doesn't fit"}}));
 }
 
 TEST(Show, TheProjectIsShownUnderItsName)
@@ -514,7 +574,7 @@ TEST(BadProject, ANameThatIsNoUtf8)
     const TempFolder folder;
     const std::string file = folder.write("caf\xe9.stage", soundProject());
 
-    expectStopped(runCadrel({"show", file}), (folder / "caf?.stage").string(),
+    expectStopped(runCadrel({"show", file}), (folder / "caf\xc3\xa9.stage").string(),
                   "the name is no UTF-8 text; rename the file or its folder");
 }
 

@@ -87,6 +87,7 @@ public:
         for (standin::Parameter* const parameter : {&project.locatorLeft(), &project.locatorRight(),
                                                     &project.cycleLeft(), &project.cycleRight(), &project.position()})
             parameter->setValue(0, 0.0);
+        project.removeAttribute(AttributeKey::ProjectEnd);
         for (standin::Track* const track : project.allTracks()) {
             track->setLocked(false);
             track->removeAttribute(AttributeKey::LockState);

@@ -8,6 +8,7 @@
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
 #include "host/undo/PreviewEventsStep.h"
+#include "tests/host/PreviewedFilm.h"
 #include "tests/host/project/AlteredEdits.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/RecordingListener.h"
@@ -39,73 +40,7 @@ using core::ChangeContext;
 using core::PropertyKey;
 using util::Result;
 
-using Texts = std::vector<std::string>;
-using Entries = AdaptedHost::Entries;
-using Node = AdaptedHost::Node;
-using Span = std::pair<double, double>;
-
-/// The first whole day behind the film, in seconds of the clock.
-constexpr double Day = 86400.0;
-
-/// A film of two clips of ten seconds that change places, previewed.
-class HostPreviewTest : public AtEachOrigin {
-protected:
-    HostPreviewTest()
-    {
-        host.addSound(track, u"one", 0.0, 10.0);
-        host.addSound(track, u"two", 10.0, 20.0);
-        host.switchMarkersOff();
-        host.carryOver("01:00:00:00", "01:00:10:00", "01:00:10:00", "01:00:20:00");
-        host.carryOver("01:00:10:00", "01:00:20:00", "01:00:00:00", "01:00:10:00");
-        host.project.locatorLeft().setValue(0, 3.0);
-        host.project.locatorRight().setValue(0, 8.0);
-        host.project.cycleLeft().setValue(0, 4.0);
-        host.project.cycleRight().setValue(0, 9.0);
-        host.project.position().setValue(0, 5.0);
-        entriesBefore = host.undoNames();
-    }
-
-    Host& adapter() { return host.adapter(); }
-    core::EventList& changes() { return host.model().changeEdl(); }
-    core::EventList firstChange()
-    {
-        core::EventList list;
-        list.append(changes(), 0, 1);
-        return list;
-    }
-    core::EventList secondChange()
-    {
-        core::EventList list;
-        list.append(changes(), 1, 1);
-        return list;
-    }
-    /// As the window does it.
-    void previewAll()
-    {
-        adapter().setPreviewActive(true);
-        host.preview(changes());
-    }
-
-    Entries entriesBeforeAnd(std::initializer_list<std::u16string> names) const
-    {
-        Entries entries = entriesBefore;
-        entries.insert(entries.end(), names);
-        return entries;
-    }
-    bool isLocked(const Node& node) { return query<ITrackNode>(node)->getFlag(TrackFlag::Lock) == ResultOk; }
-    Span transportCycle() { return {host.project.cycleLeft().getValue(), host.project.cycleRight().getValue()}; }
-    Span locators() { return {host.project.locatorLeft().getValue(), host.project.locatorRight().getValue()}; }
-    bool hasOffset()
-    {
-        core::Variant offset(Project::NoPreviewOffset);
-        host.model().getProperty(PropertyKey::PreviewOffset, offset);
-        return offset.toDouble() > Project::NoPreviewOffset;
-    }
-
-    AdaptedHost host{GetParam()};
-    Node track = host.addTrack(TypeWord::Audio, u"DX");
-    Entries entriesBefore;
-};
+class HostPreviewTest : public PreviewedFilm {};
 
 INSTANTIATE_TEST_SUITE_P(Origins, HostPreviewTest, testing::Values(0.0, 3600.0));
 
@@ -498,12 +433,11 @@ TEST_P(HostPreviewTest, TakesItsRoomAlongWhenItIsUndoneAndRedone)
 {
     const double end = host.project.getEnd(nullptr);
     previewAll();
-    const double extended = host.project.getEnd(nullptr);
 
     ASSERT_TRUE(host.undo());
     EXPECT_EQ(host.project.getEnd(nullptr), end);
     ASSERT_TRUE(host.redo());
-    EXPECT_EQ(host.project.getEnd(nullptr), extended);
+    EXPECT_EQ(host.project.getEnd(nullptr), Day + host.inHost(20.0)) << "To the end of the copies.";
     adapter().setPreviewActive(false);
 
     EXPECT_EQ(host.project.getEnd(nullptr), end);
@@ -754,7 +688,6 @@ TEST_P(HostPreviewTest, ComesBackWhenItsEndIsUndone)
 {
     const double end = host.project.getEnd(nullptr);
     previewAll();
-    const double extended = host.project.getEnd(nullptr);
     const Texts during = host.contentOf(track);
     adapter().setPreviewActive(false);
 
@@ -762,7 +695,7 @@ TEST_P(HostPreviewTest, ComesBackWhenItsEndIsUndone)
     EXPECT_TRUE(adapter().isPreviewActive());
     EXPECT_TRUE(hasOffset());
     EXPECT_EQ(host.contentOf(track), during);
-    EXPECT_EQ(host.project.getEnd(nullptr), extended);
+    EXPECT_EQ(host.project.getEnd(nullptr), Day + host.inHost(20.0)) << "To the end of the copies.";
 
     ASSERT_TRUE(host.redo());
     EXPECT_FALSE(adapter().isPreviewActive());
@@ -929,9 +862,11 @@ TEST_P(HostPreviewTest, ForgetsItsRequestsWhenItIsEmptied)
 TEST_P(HostPreviewTest, KeepsWhatItHasDoneWhenItCannotBeEmptied)
 {
     previewAll();
-    host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(1e300));
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->deletes = false;
+    host.altered.replace(IEditService::iid, edits);
 
-    EXPECT_EQ(adapter().endPreview(), Result::HostCallFailed) << "The host has no such time.";
+    EXPECT_EQ(adapter().endPreview(), Result::HostCallFailed);
 
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"Delete Preview Range (incomplete)"}));
     EXPECT_FALSE(host.isEditOpen());
@@ -940,7 +875,9 @@ TEST_P(HostPreviewTest, KeepsWhatItHasDoneWhenItCannotBeEmptied)
 TEST_P(HostPreviewTest, SaysThatItsEndIsIncomplete)
 {
     previewAll();
-    host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(1e300));
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->deletes = false;
+    host.altered.replace(IEditService::iid, edits);
 
     EXPECT_EQ(thrownBy([&] { adapter().setPreviewActive(false); }), Result::HostCallFailed);
 
@@ -1088,17 +1025,6 @@ TEST_P(HostPreviewTest, MovesFurtherAwayWhereTheTimeOriginHasMoved)
     adapter().setPreviewActive(false);
 
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
-}
-
-TEST_P(HostPreviewTest, StaysWhereItIsAsLongAsItIsOn)
-{
-    previewAll();
-    host.addSound(track, u"late", Day, Day + 40.0);
-
-    host.preview(secondChange());
-
-    EXPECT_EQ(adapter().getRunState().previewOffset, Day);
-    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410"}));
 }
 
 // Memos.

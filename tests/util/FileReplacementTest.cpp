@@ -13,6 +13,7 @@
 
 #include <array>
 #include <cerrno>
+#include <chrono>
 #include <cstring>
 #include <fcntl.h>
 #include <filesystem>
@@ -81,6 +82,71 @@ TEST(FileReplacement, LeavesNothingBehindWhenItIsDropped)
 
     EXPECT_EQ(contentOf(path), "former");
     EXPECT_EQ(folder.names(), Names{"a.txt"});
+}
+
+/// What another program can do to a file that was there before, or to its name.
+enum class Meanwhile { Longer, Rewritten, OtherFile, Removed };
+
+TEST(FileReplacement, RefusesATargetThatAnotherProgramHasWrittenSince)
+{
+    for (const Meanwhile meanwhile :
+         {Meanwhile::Longer, Meanwhile::Rewritten, Meanwhile::OtherFile, Meanwhile::Removed}) {
+        const TempFolder folder;
+        const fs::path path = folder.write("a.txt", "former");
+        const auto formerTime = fs::last_write_time(path);
+        const util::FileStamp stamp = util::FileStamp::of(path);
+        FileReplacement file(path);
+        file.write("new");
+        if (meanwhile == Meanwhile::Removed)
+            fs::remove(path);
+        if (meanwhile == Meanwhile::OtherFile)
+            fs::rename(folder.write("b.txt", "former"), path);
+        if (meanwhile == Meanwhile::Longer)
+            folder.write("a.txt", "longer than it was");
+        if (meanwhile != Meanwhile::Removed)
+            fs::last_write_time(path, meanwhile == Meanwhile::Rewritten ? formerTime + std::chrono::nanoseconds(1)
+                                                                        : formerTime);
+        const bool exists = fs::exists(path);
+        const std::string found = exists ? contentOf(path) : std::string();
+
+        EXPECT_THROW(file.commit(stamp), FileReplacement::TargetChanged) << static_cast<int>(meanwhile);
+
+        EXPECT_EQ(fs::exists(path), exists);
+        EXPECT_EQ(exists ? contentOf(path) : std::string(), found);
+    }
+}
+
+TEST(FileReplacement, RefusesATargetThatHasComeUpSince)
+{
+    const TempFolder folder;
+    const fs::path path = folder / "a.txt";
+    const util::FileStamp none = util::FileStamp::of(path);
+    EXPECT_FALSE(none.exists);
+    FileReplacement file(path);
+    file.write("new");
+    folder.write("a.txt", "of another program");
+
+    EXPECT_THROW(file.commit(none), FileReplacement::TargetChanged);
+
+    EXPECT_EQ(contentOf(path), "of another program");
+}
+
+TEST(FileReplacement, TakesATargetThatIsAsItWasAlsoThroughALink)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("a.txt", "former");
+    fs::create_symlink("a.txt", folder / "link");
+    const util::FileStamp stamp = util::FileStamp::of(folder / "link");
+    EXPECT_EQ(stamp, util::FileStamp::of(path));
+    // Another name and another right to read it are no saving.
+    fs::create_hard_link(path, folder / "second name");
+    FileReplacement file(folder / "link");
+    file.write("new");
+
+    file.commit(stamp);
+
+    EXPECT_EQ(contentOf(path), "new");
+    EXPECT_EQ(contentOf(folder / "second name"), "former");
 }
 
 TEST(FileReplacement, KeepsThePermissionsOfTheFormerFile)

@@ -31,13 +31,6 @@ const std::string& CadrelInformationAlgorithm::nameOf(const EventBase& event, co
     return state.settings->matchBy() != MatchBy::RollName ? event.clipName() : event.rollName();
 }
 
-bool CadrelInformationAlgorithm::hasPlace(const EventBase& event, const Framerate& framerate)
-{
-    // EventFlaw::TimecodeInvalid and TimecodeRangeInvalid may be those of the source.
-    return !event.hasFlaw(EventFlaw::DstInUnreadable) && !event.hasFlaw(EventFlaw::DstOutUnreadable) &&
-           event.dstIn().isValid(framerate) && event.dstOut().isValid(framerate) && !(event.dstOut() < event.dstIn());
-}
-
 std::vector<std::shared_ptr<Cut>> CadrelInformationAlgorithm::inTimeOrder(const CutList& cuts)
 {
     const auto ordered = cuts.orderedByStart();

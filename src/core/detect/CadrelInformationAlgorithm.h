@@ -38,8 +38,6 @@ protected:
     static void stopIfCancelled(ProgressHandlerBase* progress);
     /// The name by which events are matched: that of the clip or of the roll.
     static const std::string& nameOf(const EventBase& event, const CadrelRunState& state);
-    /// Whether the place of an event in its programme could be read and makes sense, whatever its source.
-    static bool hasPlace(const EventBase& event, const Framerate& framerate);
     /// The cuts of CutList::orderedByStart.
     static std::vector<std::shared_ptr<Cut>> inTimeOrder(const CutList& cuts);
 };

@@ -7,6 +7,7 @@
 #include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
+#include "core/edl/ProgrammePlace.h"
 
 namespace cadrel::core {
 

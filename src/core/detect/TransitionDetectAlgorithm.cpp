@@ -6,6 +6,7 @@
 #include "core/cut/CutList.h"
 #include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
+#include "core/edl/ProgrammePlace.h"
 
 #include <algorithm>
 #include <iterator>

@@ -56,10 +56,11 @@ BlackCarrying::BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLi
     m_material = within(m_day, m_allMaterial);
 }
 
-void BlackCarrying::run()
+void BlackCarrying::run(const std::vector<ChangeStretch>& changes)
 {
     carryWithinReels();
     carryAroundReels();
+    carryAsChanged(changes);
 }
 
 FrameRanges BlackCarrying::lost() const
@@ -125,6 +126,18 @@ void BlackCarrying::carryAroundReels()
     }
     for (const FrameRange& block : staying)
         carry(block, 0, AllTime);
+}
+
+void BlackCarrying::carryAsChanged(const std::vector<ChangeStretch>& changes)
+{
+    FrameRanges left = lost();
+    for (const ChangeStretch& stretch : changes) {
+        const FrameRanges found = within(stretch.source(), left);
+        for (const FrameRange& range : found)
+            carry(range, stretch.shift, AllTime);
+        if (!found.empty())
+            left = lost();
+    }
 }
 
 std::vector<BlackCarrying::Surroundings> BlackCarrying::surroundings() const

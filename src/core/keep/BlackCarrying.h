@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/keep/CarriedStretches.h"
+#include "core/keep/ChangeStretch.h"
 #include "core/keep/FrameRange.h"
 #include "core/keep/Reels.h"
 #include "core/time/Framerate.h"
@@ -28,7 +29,8 @@ public:
     BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLit, const Reels& reels, const FrameRanges& material,
                   const Framerate& framerate, CarriedStretches& carried);
 
-    void run();
+    /// What finds no room beside its picture or its reel goes where the change EDL carries it, if it does.
+    void run(const std::vector<ChangeStretch>& changes);
 
     /// The material in the black of the old cut, within the day.
     const FrameRanges& material() const { return m_material; }
@@ -50,6 +52,7 @@ private:
     void carryBetween(const FrameRange& gap, const std::vector<std::int32_t>& leftShifts,
                       const std::vector<std::int32_t>& rightShifts, bool isLeftWhole);
     void carryAroundReels();
+    void carryAsChanged(const std::vector<ChangeStretch>& changes);
     std::vector<Surroundings> surroundings() const;
     /// Whether the block goes along with a reel.
     bool carryAttached(const Surroundings& around, const FrameRange& block);

@@ -3,6 +3,10 @@
 #include "core/keep/ChangeStretch.h"
 
 #include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/edl/HealedEvent.h"
+
+#include <algorithm>
 
 namespace cadrel::core {
 
@@ -18,6 +22,26 @@ std::optional<ChangeStretch> changeStretchOf(const EventBase& event, const Frame
     if (length <= 0)
         return std::nullopt;
     return ChangeStretch{{dstIn, dstIn + length}, dstIn - srcIn};
+}
+
+std::vector<ChangeStretch> unhealedStretches(const EventList& changeEvents, const Framerate& framerate)
+{
+    std::vector<ChangeStretch> stretches;
+    std::vector<const EventList*> lists{&changeEvents};
+    while (!lists.empty()) {
+        const EventList& list = *lists.back();
+        lists.pop_back();
+        for (const auto& event : list.events()) {
+            if (const auto* healed = dynamic_cast<const HealedEvent*>(event.get()))
+                lists.push_back(&healed->healedEvents());
+            else if (const auto stretch = changeStretchOf(*event, framerate))
+                stretches.push_back(*stretch);
+        }
+    }
+    std::stable_sort(stretches.begin(), stretches.end(), [](const ChangeStretch& a, const ChangeStretch& b) {
+        return a.destination.start < b.destination.start;
+    });
+    return stretches;
 }
 
 } // namespace cadrel::core

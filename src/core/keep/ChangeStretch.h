@@ -6,10 +6,12 @@
 #include "core/time/Framerate.h"
 
 #include <optional>
+#include <vector>
 
 namespace cadrel::core {
 
 class EventBase;
+class EventList;
 
 /// What an event of a change EDL carries, in frames.
 struct ChangeStretch {
@@ -22,5 +24,8 @@ struct ChangeStretch {
 /// Nothing for an event whose timecodes don't exist at the rate, or that carries nothing. Where both sides differ in
 /// length, the SRC decides.
 std::optional<ChangeStretch> changeStretchOf(const EventBase& event, const Framerate& framerate);
+
+/// What a change EDL carries, without healing, ascending by destination.
+std::vector<ChangeStretch> unhealedStretches(const EventList& changeEvents, const Framerate& framerate);
 
 } // namespace cadrel::core

@@ -27,7 +27,7 @@ struct KeepRefusal {
     enum Reason {
         UnequalReels,    ///< the reels of the two cuts can't be paired; see `oldReels` and `newReels`
         OutsideOfDay,    ///< `material` would have to move, and it stands, or came to stand, where no timecode is
-        MaterialInTheWay ///< `material` stands where grown picture goes
+        MaterialInTheWay ///< `material` stands where grown picture goes, or on the way there
     };
 
     Reason reason = UnequalReels;
@@ -50,7 +50,10 @@ struct KeepPlan {
     std::vector<KeptEvent> untouched;
     /// The stretch that the run has to be restricted to. Nothing: there is nothing to do, and no run.
     std::optional<FrameRange> hull;
-    /// The material in the old cut's black that goes, since it finds no room in the new one's; old programme.
+    /// Something would have to change, but all of it stands where the user lets nothing change.
+    bool isHeldBack = false;
+    /// The material in the old cut's black that goes, since it finds no room in the new one's; with a given list all that it
+    /// carries nowhere. In the old programme.
     FrameRanges lost;
 
     bool needsRun() const { return hull.has_value(); }

@@ -90,7 +90,7 @@ KeepPlan KeepPlanner::plan(const EventList& oldEvents, const EventList& newEvent
     PictureCarrying(oldLine, newLine, reels, carried).run(changeEvents, framerate);
     BlackCarrying black(oldLine.lit(), newLine.lit(), reels, framesOfMaterial(m_context.material, framerate), framerate,
                         carried);
-    black.run();
+    black.run(unhealedStretches(changeEvents, framerate));
 
     KeepPlan plan;
     plan.lost = black.lost();
@@ -126,10 +126,16 @@ KeepPlan KeepPlanner::planGiven(const EventList& changeEvents) const
         return plan;
     const FrameRange hull{std::min(source->start, destination->start), std::max(source->end, destination->end)};
     const FrameRanges material = framesOfMaterial(m_context.material, m_context.framerate);
-    plan.lost = without(within(*destination, material), {*source});
+    const FrameRanges inTheWay = without(within(hull, material), {*source});
+    plan.lost = inTheWay;
+    for (const FrameRange& gap : without({*source}, united(std::move(sources)))) {
+        if (const auto left = spanOf(within(gap, material)))
+            plan.lost.push_back(*left);
+    }
+    plan.lost = united(std::move(plan.lost));
     restrictTo(hull, std::move(events), plan);
-    if (!plan.lost.empty() && !m_context.isForced)
-        plan.refusal = refusalFor(KeepRefusal::MaterialInTheWay, plan.lost);
+    if (!inTheWay.empty() && !m_context.isForced)
+        plan.refusal = refusalFor(KeepRefusal::MaterialInTheWay, inTheWay);
     return plan;
 }
 
@@ -139,6 +145,7 @@ void KeepPlanner::restrictTo(const std::optional<FrameRange>& hull, std::vector<
     if (hull && m_context.preserve) {
         const FrameRanges allowed = framesOfMaterial({*m_context.preserve}, m_context.framerate);
         plan.hull = spanOf(within(*hull, allowed));
+        plan.isHeldBack = !plan.hull;
     }
     for (KeptEvent& event : events) {
         const bool isInHull = plan.hull && !intersect(event.destination, *plan.hull).isEmpty();

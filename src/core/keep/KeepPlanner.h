@@ -50,8 +50,9 @@ public:
     /// Result::InvalidArgument for material that ends before it starts, or a row of VFX patterns that doesn't compile.
     KeepPlan plan(const EventList& oldEvents, const EventList& newEvents, const EventList& changeEvents) const;
 
-    /// The plan for a change EDL that was given: its events as they are, and the hull of all its SRC and DST. Material
-    /// outside of the SRC on which its DST would lie is in the way: a refusal, unless forced.
+    /// The plan for a change EDL that was given: its events as they are, and the hull of all its SRC and DST. Material in
+    /// the hull before the first SRC or after the last one is in the way: a refusal, unless forced. What stands in a gap
+    /// between the SRC goes as the list has it, and is told as lost.
     KeepPlan planGiven(const EventList& changeEvents) const;
 
 private:

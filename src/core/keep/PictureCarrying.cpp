@@ -4,35 +4,9 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
-#include "core/edl/HealedEvent.h"
 #include "core/keep/ChangeStretch.h"
 
 namespace cadrel::core {
-
-namespace {
-
-/// The events of a change EDL without healing.
-std::vector<ChangeStretch> unhealed(const EventList& changeEvents, const Framerate& framerate)
-{
-    std::vector<ChangeStretch> stretches;
-    std::vector<const EventList*> lists{&changeEvents};
-    while (!lists.empty()) {
-        const EventList& list = *lists.back();
-        lists.pop_back();
-        for (const auto& event : list.events()) {
-            if (const auto* healed = dynamic_cast<const HealedEvent*>(event.get()))
-                lists.push_back(&healed->healedEvents());
-            else if (const auto stretch = changeStretchOf(*event, framerate))
-                stretches.push_back(*stretch);
-        }
-    }
-    std::stable_sort(stretches.begin(), stretches.end(), [](const ChangeStretch& a, const ChangeStretch& b) {
-        return a.destination.start < b.destination.start;
-    });
-    return stretches;
-}
-
-} // namespace
 
 PictureCarrying::PictureCarrying(const PictureLine& oldLine, const PictureLine& newLine, const Reels& reels,
                                  CarriedStretches& carried)
@@ -76,7 +50,7 @@ void PictureCarrying::carryReelEnds()
 
 void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const Framerate& framerate)
 {
-    const std::vector<ChangeStretch> stretches = unhealed(changeEvents, framerate);
+    const std::vector<ChangeStretch> stretches = unhealedStretches(changeEvents, framerate);
     // Of several layers that claim one frame, that one is right under which the whole picture is the same.
     for (const ChangeStretch& stretch : stretches)
         carryEqual(stretch.shift, stretch.destination, CarriedFrom::Cut);

@@ -4,12 +4,11 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
+#include "core/edl/ProgrammePlace.h"
 #include "core/keep/PictureNames.h"
 
 #include <algorithm>
-#include <cctype>
 #include <set>
-#include <string>
 #include <tuple>
 
 namespace cadrel::core {
@@ -23,30 +22,6 @@ struct LayerOrder {
         return std::tie(a.material, a.speed, a.origin, a.event) < std::tie(b.material, b.speed, b.origin, b.event);
     }
 };
-
-/// The rolls that stand for black in every edit decision list.
-bool isBlackRoll(std::string roll)
-{
-    std::transform(roll.begin(), roll.end(), roll.begin(),
-                   [](unsigned char letter) { return static_cast<char>(std::toupper(letter)); });
-    return roll == "BL" || roll == "BLACK";
-}
-
-bool isPicture(const EventBase& event, const Framerate& framerate)
-{
-    const bool hasDestination = !event.hasFlaw(EventFlaw::DstInUnreadable) &&
-                                !event.hasFlaw(EventFlaw::DstOutUnreadable) && event.dstIn().isValid(framerate) &&
-                                event.dstOut().isValid(framerate) && event.dstIn() < event.dstOut();
-    return hasDestination && !event.hasFlaw(EventFlaw::NotVideoEvent) && !isBlackRoll(event.rollName());
-}
-
-/// The first line of a transition in two lines.
-const EventBase* outgoingOf(const EventList& events, std::size_t index)
-{
-    if (index == 0 || events.at(index - 1).eventNumber() != events.at(index).eventNumber())
-        return nullptr;
-    return &events.at(index - 1);
-}
 
 } // namespace
 
@@ -79,7 +54,7 @@ std::vector<PictureLine::Edge> PictureLine::edgesOf(const EventList& events, Pic
     };
     for (std::size_t index = 0; index < events.size(); ++index) {
         const EventBase& event = events.at(index);
-        if (!isPicture(event, framerate))
+        if (!fillsProgramme(event, framerate) || isBlack(event))
             continue;
         const FrameRange frames{event.dstIn().toFrameCount(framerate), event.dstOut().toFrameCount(framerate)};
         PictureLayer layer;

@@ -40,8 +40,7 @@ struct PropertyKey {
         NewTableSelection = 10018,      ///< string, likewise
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
-        ProjectEnd = 10021,             ///< double, from the time origin, as it stood when the preview went on
-        PreviewOrigin = 10022,          ///< double, the time origin when the preview stretch was written
+        EarlierRuns = 10022,            ///< string, the bytes of PastRuns without the run that the lists tell of
     };
 };
 

@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/MatchedName.h"
+#include "core/edl/ProgrammePlace.h"
 
 #include <algorithm>
 #include <cmath>
@@ -29,14 +30,6 @@ std::string materialText(const std::string& kind, std::initializer_list<std::str
 std::string timesOf(const EventBase& event)
 {
     return event.srcIn().toString() + " " + event.srcOut().toString();
-}
-
-/// The event of the outgoing side: a transition's two lines share their number.
-const EventBase* outgoingOf(const EventList& events, std::size_t index)
-{
-    if (index == 0 || events.at(index - 1).eventNumber() != events.at(index).eventNumber())
-        return nullptr;
-    return &events.at(index - 1);
 }
 
 /// The material's name without its version. A reversed shot is another material than one that plays forwards.
@@ -103,13 +96,6 @@ ShownRun EventPicture::runFrom(std::int32_t from) const
             .sourceStep = material.sourceStep,
             .event = m_event,
             .isTransition = isTransition};
-}
-
-bool hasPlace(const EventBase& event, const Framerate& framerate)
-{
-    return event.dstIn().isInitialized() && event.dstOut().isInitialized() && event.dstIn().isValid(framerate) &&
-           event.dstOut().isValid(framerate) && event.dstIn() < event.dstOut() &&
-           !event.hasFlaw(EventFlaw::NotVideoEvent);
 }
 
 bool tellsNothing(const std::string& name)

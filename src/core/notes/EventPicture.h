@@ -32,9 +32,6 @@ private:
     std::int32_t m_transitionLength = 0;
 };
 
-/// Whether the event takes a place in the programme.
-bool hasPlace(const EventBase& event, const Framerate& framerate);
-
 /// Whether a name tells nothing of the material.
 bool tellsNothing(const std::string& name);
 

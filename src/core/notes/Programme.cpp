@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/MatchedName.h"
+#include "core/edl/ProgrammePlace.h"
 #include "core/keep/Reels.h"
 #include "core/notes/EventPicture.h"
 
@@ -31,7 +32,7 @@ std::vector<Place> placesOf(const EventList& events, const Framerate& framerate)
     std::vector<Place> places;
     for (std::size_t index = 0; index < events.size(); ++index) {
         const EventBase& event = events.at(index);
-        if (hasPlace(event, framerate))
+        if (fillsProgramme(event, framerate))
             places.push_back({event.dstIn().toFrameCount(framerate), event.dstOut().toFrameCount(framerate),
                               static_cast<std::int32_t>(index)});
     }
@@ -92,7 +93,7 @@ std::vector<DoubtfulEvent> doubtsOf(const EventList& events, const PictureRules&
         const bool isOutgoingSide = event.isValid() && event.dstIn() == event.dstOut();
         if (isOutgoingSide)
             continue;
-        if (!hasPlace(event, rules.framerate)) {
+        if (!fillsProgramme(event, rules.framerate)) {
             add(PictureDoubt::NoPicture);
             continue;
         }

@@ -4,6 +4,8 @@
 
 #include "host/border/HostFailure.h"
 #include "util/HostString.h"
+#include "velmark/Editing.h"
+#include "velmark/Tracks.h"
 
 #include <string_view>
 
@@ -18,6 +20,16 @@ std::vector<Counted<IProjectNode>> childrenOf(IProjectNode& node)
     while (!iterator->isDone())
         children.push_back(Counted<IProjectNode>::share(required(iterator->next())));
     return children;
+}
+
+std::vector<Counted<IProjectNode>> curvesOf(ITrackNode& track)
+{
+    std::vector<Counted<IProjectNode>> curves;
+    const auto list = Counted<IObjectList>::adopt(track.getAutomation());
+    const int32 count = list ? list->count() : 0;
+    for (int32 index = 0; index < count; ++index)
+        curves.push_back(required(query<IProjectNode>(required(list->at(index)))));
+    return curves;
 }
 
 std::wstring nameOf(IProjectNode& node)

@@ -47,8 +47,8 @@ bool areSame(const core::Framerate& a, const core::Framerate& b)
 } // namespace
 
 Project::Project(IHostContext* context, IProjectDocument* document)
-    : m_document(required(document)), m_mediaPool(context, document->getMediaPool()), m_hostContext(context),
-      m_memoSync(context)
+    : m_document(Counted<IProjectDocument>::share(required(document))), m_mediaPool(context, document->getMediaPool()),
+      m_hostContext(context), m_end(context, document, [this] { return contentEnd(); }), m_memoSync(context)
 {
 }
 
@@ -172,14 +172,14 @@ void Project::computePreviewOffset()
 
 void Project::ensurePreviewOffset()
 {
-    const bool isInUse = m_model.isPreviewActive() || !m_previewEvents->isEmpty() || m_hasLeftovers;
-    if (!hasPreviewOffset() || (!isInUse && previewOffset() < dayPastMaterial()))
+    if (!hasPreviewOffset() || (!hasWritten() && previewOffset() < dayPastMaterial()))
         computePreviewOffset();
 }
 
 double Project::dayPastMaterial()
 {
-    return dayAfter(latestEnd(cadrelTracks(), projectEnd(), timeOrigin()));
+    const std::vector<Track> tracks = cadrelTracks();
+    return dayAfter(std::max(latestEnd(tracks, projectEnd(), timeOrigin()), latestPoint(tracks)));
 }
 
 double Project::requiredOffset() const
@@ -264,11 +264,10 @@ void Project::onProjectEdited(IEditTransaction& transaction)
     failure.raise();
 }
 
-MemoSync::Previewed Project::previewed() const
+MemoSync::Previewed Project::previewed()
 {
-    Variant origin(timeOrigin());
-    m_model.getProperty(PropertyKey::PreviewOrigin, origin);
-    return {m_previewEvents->events(), getFramerate(), requiredOffset(), timeOrigin() - origin.toDouble()};
+    const double start = requiredOffset() - timeOrigin();
+    return {m_previewEvents->events(), getFramerate(), requiredOffset(), writtenFrom().value_or(start) - start};
 }
 
 void Project::syncMemos(IEditTransaction& transaction)

@@ -10,6 +10,7 @@
 #include "core/time/FramerateProvider.h"
 #include "host/project/MediaPool.h"
 #include "host/project/MemoSync.h"
+#include "host/project/ProjectEnd.h"
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
 #include "host/track/TrackIndexes.h"
@@ -64,13 +65,13 @@ public:
     /// The preview offset of a project that has none.
     static constexpr double NoPreviewOffset = std::numeric_limits<double>::lowest();
 
-    /// Neither is owned. The document outlives the project.
+    /// The context outlives the project.
     Project(Velmark::IHostContext* context, Velmark::IProjectDocument* document);
     Project(const Project&) = delete;
     Project& operator=(const Project&) = delete;
     ~Project();
 
-    Velmark::IProjectDocument* document() const { return m_document; }
+    Velmark::IProjectDocument* document() const { return m_document.get(); }
     Velmark::IHostContext* hostContext() const override { return m_hostContext; }
     core::DataModel& model() { return m_model; }
     /// For those who may outlive the project, and hold it weakly.
@@ -116,14 +117,11 @@ public:
     /// NoPreviewOffset when there is none.
     double previewOffset() const;
     void resetPreviewOffset();
-    /// Stores the first whole day past every event in the project as the offset; automation points further on don't
-    /// count.
+    /// Stores the first whole day past every event and every automation point in the project as the offset.
     void computePreviewOffset();
     /// Does so where there is none, or where the one there has become too small: the time origin has moved, or material
-    /// has come to reach it. While the preview stretch holds what the system has written, the offset stays.
+    /// has come to reach it. What the system has written stands where it was written, and has to be cleared first.
     void ensurePreviewOffset();
-    /// Whether an edit that has failed may have left something in the preview stretch.
-    void setLeftovers(bool flag) { m_hasLeftovers = flag; }
     void getLocators(double& left, double& right) const;
     /// With `adjust` both move down by a tenth of their distance and lose the time origin; without they go to the host as
     /// they are.
@@ -143,6 +141,8 @@ public:
     void collectLockTracks();
     /// Adds the tracks that the system holds locked, as a file or an undo has left them.
     void findLockedTracks();
+    /// Adds the tracks that a preview shows, as a file or an undo has left it.
+    void findPreviewedTracks();
     bool hasLockTracks() const { return !m_lockedTracks.empty(); }
     void releaseLockTracks() { m_lockedTracks.clear(); }
 
@@ -167,14 +167,27 @@ public:
     /// Lets the automation run straight where two cuts that follow on one another in the list don't meet, but for what
     /// another cut has written there. The cuts are those that makeCut made.
     void markVirginTerritories(Velmark::IEditTransaction& transaction, const core::CutList& cuts);
-    /// Unlocks the tracks and empties the preview stretch.
+
+    // What has been written in the preview stretch, which the tracks keep as PreviewRecord says; in ProjectPreview.cpp.
+
+    /// Whether a preview, or a run that has failed, has written something that isn't cleared yet.
+    bool hasWritten();
+    /// From now on all that comes to stand past the preview offset is the system's. Once the preview is cleared it is past
+    /// all that the user has.
+    void startWriting();
+    /// Lets the tracks keep what was written since then, also those with nothing that collectLockTracks has found. Carries
+    /// out all, and throws the first failure at the end.
+    void rememberWritten();
+    /// Unlocks the tracks and takes away what is kept as written. What the user has laid there since stays, and so does
+    /// what he has changed. Automation in the stretch stays only on tracks on which nothing was written.
     void clearPreview(Velmark::IEditTransaction& transaction);
+
     /// What a run replaces.
     void getApplyRange(double& start, double& end) const;
     /// Lets the host join the pieces that the cuts have left of one clip.
     void closeRange(bool onlySelected, double start, double end);
     /// While a preview is on, makes room for it; with `active` only tracks that have changed count. Without one, puts the
-    /// end of the project back where it stood before room was made, and does nothing where none was.
+    /// end of the project back, as ProjectEnd says.
     void extendProjectEnd(bool active);
     core::CadrelRunState runState();
     core::CadrelPreviewState previewState();
@@ -213,10 +226,13 @@ private:
     Velmark::IParameter& locator(const char* name) const;
     void tellListeners(FirstFailure& failure);
     bool isPreviewing() const;
-    MemoSync::Previewed previewed() const;
-    void restoreProjectEnd();
-    /// From the time origin; nothing where no room was made.
-    std::optional<double> endBeforePreview() const;
+    MemoSync::Previewed previewed();
+    /// Of the last event of any track, from the time origin.
+    double contentEnd();
+    /// Of the last automation point.
+    double latestPoint(const std::vector<Track>& tracks) const;
+    /// Where what is shown begins, from the time origin; nothing when nothing is. It doesn't move with the origin.
+    std::optional<double> writtenFrom();
     void syncMemos(Velmark::IEditTransaction& transaction);
     void rememberMemos();
 
@@ -225,6 +241,16 @@ private:
     bool isMarkerTrack(const Track& track) const;
     /// A marker track on which runs alone write: any but the memos'.
     bool isMarkerTrackOfRuns(const Track& track) const;
+    /// All that a run may change but these.
+    std::vector<Track> tracksOfTheUser();
+    /// What of a track's events in a stretch the system hasn't written, in seconds from the time origin.
+    std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
+                                                                     const core::SecondsRange& stretch);
+    /// Removes the automation points in a stretch, in seconds from the time origin, where none follow. Emptying the stretch
+    /// would leave one at its start, as the values of the system's own points are rounded. Where others follow, the curve
+    /// needs it to go on before the stretch as it did.
+    static void removePoints(Velmark::IEditTransaction& transaction, const Track& track,
+                             const core::SecondsRange& stretch);
     /// By its role; an empty handle without one.
     Track newVideoTrack();
     /// Whether markers can be written there. On a track that the user has locked they would stay in the preview stretch.
@@ -254,7 +280,7 @@ private:
     void tick(std::uint64_t steps);
 
     util::ListenerSet<ProjectListener> m_listeners; ///< before all tracks, which are among them
-    Velmark::IProjectDocument* m_document;
+    const Velmark::Counted<Velmark::IProjectDocument> m_document;
     MediaPool m_mediaPool;
     std::array<Track, TrackRole::LastMarker> m_markerTracks; ///< by role, less one
     Track m_folderTrack;
@@ -265,12 +291,12 @@ private:
     Velmark::IHostContext* m_hostContext;
     mutable core::Framerate m_framerate; ///< unknown until it's read
     const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
-    /// As PropertyKey::ProjectEnd, which undo steps take along with the model, though not the end itself.
-    std::optional<double> m_endBeforePreview;
+    ProjectEnd m_end;
+    /// Where startWriting has begun, from the time origin.
+    std::optional<double> m_writingFrom;
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;
-    bool m_hasLeftovers = false;
     TrackIndexes m_indexes; ///< cleared by each edit
     MemoSync m_memoSync;
 };

@@ -9,6 +9,7 @@
 #include "core/settings/Settings.h"
 #include "core/time/SecondsRange.h"
 #include "host/border/HostFailure.h"
+#include "host/border/NodeReading.h"
 #include "host/project/Project.h"
 #include "host/track/AutomationCurve.h"
 #include "host/track/CutEvent.h"
@@ -127,6 +128,13 @@ GapTracks gapTracksOf(const std::vector<Track>& tracks, const core::CutList& cut
     return found;
 }
 
+/// What of `range` none of the ranges covers, which are in order and don't touch.
+std::vector<SecondsRange> gapsBetween(const std::vector<SecondsRange>& ranges, const SecondsRange& range)
+{
+    std::vector<SecondsRange> covered = ranges;
+    return cover(covered, range);
+}
+
 std::vector<const Track*> pointersTo(const std::vector<Track>& tracks)
 {
     std::vector<const Track*> pointers;
@@ -188,8 +196,6 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
 {
     const double offset = requiredOffset();
     const core::EventBase& event = *cut.event();
-    if (m_model.isPreviewActive())
-        m_model.setProperty(core::PropertyKey::PreviewOrigin, core::Variant(timeOrigin()));
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
     for (const SourceGroup& group : groupsOf(cut)) {
@@ -230,29 +236,39 @@ void Project::generateMarkers(IEditTransaction& transaction, const std::vector<c
 //     cuts      |     |-- fade --|     |-- 1 --|-- 2 --|       |
 //     before     _____|``--..____|_____|```````|--..___|_______       what the curve has come to at the end of the reel
 //     after      `````|``--..____|_____|```````|--..___|_______
+//
+// Before the first cut of a whole programme there is nothing to keep. Before a part of one there is.
 void Project::holdAutomation(IEditTransaction& transaction, const core::CutList& cuts, bool isWholeProgramme)
 {
     const double offset = requiredOffset();
+    const bool isPart = isWholeProgramme && m_model.settings().restrictRange();
     m_indexes.clear();
     double start = 0.0;
     double end = 0.0;
     getApplyRange(start, end);
+    start = std::max(start, 0.0);
+    const double previewEnd = std::min(end, offset - ClearedMargin);
+    // A preview shows what lies beyond the range too.
+    end = isPart ? end : offset;
     for (auto& [node, track] : gapTracksOf(automatedTracks(), cuts)) {
         const std::vector<SecondsRange>& written = track.done;
-        if (written.empty())
-            continue;
+        const std::vector<SecondsRange> gaps =
+            isPart || !written.empty() ? gapsBetween(written, {start, end}) : std::vector<SecondsRange>();
         for (AutomationCurve& curve : track.curves) {
-            curve.holdBackwards(m_hostContext, transaction, std::max(start, 0.0) + offset,
-                                written.front().start + offset);
-            for (std::size_t i = 1; i < written.size(); ++i)
-                curve.hold(m_hostContext, transaction, written[i - 1].end + offset, written[i].start + offset);
-            const double last = written.back().end + offset;
-            if (!isWholeProgramme)
-                curve.hold(m_hostContext, transaction, last, std::min(end, offset - ClearedMargin) + offset);
-            else if (m_model.settings().restrictRange())
-                curve.hold(m_hostContext, transaction, last, end + offset);
-            else
-                curve.holdLast(m_hostContext, transaction, last, end + offset);
+            for (const SecondsRange& gap : gaps) {
+                const bool isFirst = !isBefore(start, gap.start);
+                const bool isLast = !isBefore(gap.end, end);
+                if (isFirst && isPart)
+                    curve.holdAsAt(start, m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else if (isFirst)
+                    curve.holdBackwards(m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else if (!isLast || isPart)
+                    curve.hold(m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else if (isWholeProgramme)
+                    curve.holdLast(m_hostContext, transaction, gap.start + offset, gap.end + offset);
+                else
+                    curve.hold(m_hostContext, transaction, gap.start + offset, previewEnd + offset);
+            }
         }
     }
 }
@@ -303,8 +319,10 @@ void Project::completeApply(IEditTransaction& transaction)
     getApplyRange(start, end);
     if (isBefore(start, end))
         moveBack(transaction, tracks, start, end);
-    if (m_model.settings().restrictRange())
+    if (m_model.settings().restrictRange()) {
+        rememberWritten();
         clearPreview(transaction);
+    }
 }
 
 //     before    real |== old ==|           preview |== new ==|
@@ -322,16 +340,10 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
     if (!isBefore(written, end))
         return;
     copyRange(pointersTo(tracks), written + offset, end + offset, written);
+    const double origin = timeOrigin();
+    for (const Track& track : tracks)
+        removePoints(transaction, track, {written + offset - origin, end + offset - origin});
     deleteRange(transaction, written + offset, end + offset);
-}
-
-void Project::clearPreview(IEditTransaction& transaction)
-{
-    const double offset = requiredOffset();
-    setTracksLocked(false);
-    m_model.removeProperty(core::PropertyKey::PreviewOrigin);
-    // Automation may reach further than the events, which alone make the end of the project.
-    deleteRange(transaction, offset, offset + std::max(offset, projectEnd()));
 }
 
 void Project::getApplyRange(double& start, double& end) const
@@ -352,7 +364,7 @@ void Project::closeRange(bool onlySelected, double start, double end)
     const double origin = timeOrigin();
     const int32 result =
         required(service<IEditService>(m_hostContext))
-            ->closeRange(m_document, listOf(pointersTo(tracks)).get(), start - origin, end - origin, 0.0);
+            ->closeRange(m_document.get(), listOf(pointersTo(tracks)).get(), start - origin, end - origin, 0.0);
     // It is no failure if there is nothing to join.
     if (result != ResultFalse)
         requireOk(result);
@@ -361,40 +373,27 @@ void Project::closeRange(bool onlySelected, double start, double end)
 void Project::extendProjectEnd(bool active)
 {
     if (!m_model.isPreviewActive()) {
-        restoreProjectEnd();
+        m_end.putBack();
         return;
     }
     const double offset = requiredOffset();
     std::vector<Track> tracks = cadrelTracks();
     if (active)
         std::erase_if(tracks, [](const Track& track) { return !track.hasChanged(); });
-    const double end = offset + dayAfter(latestEnd(tracks, offset, 0.0));
-    if (end > projectEnd()) {
-        // Without the origin, so that it comes back to the last bit.
-        const double present = root()->getEnd(nullptr);
-        requireOk(m_document->setProjectEnd(end - timeOrigin()));
-        m_endBeforePreview = endBeforePreview().value_or(present);
+    m_end.putOffTo(offset + dayAfter(latestEnd(tracks, offset, 0.0)) - timeOrigin(), hasWritten());
+}
+
+double Project::contentEnd()
+{
+    double end = 0.0;
+    for (const auto& track : allTracks()) {
+        const auto node = required(query<IProjectNode>(track));
+        if (node->isType(TypeWord::Folder))
+            continue;
+        for (const Counted<IProjectNode>& event : childrenOf(*node))
+            end = std::max(end, event->getEnd(nullptr));
     }
-    if (m_endBeforePreview)
-        m_model.setProperty(core::PropertyKey::ProjectEnd, core::Variant(*m_endBeforePreview));
-}
-
-void Project::restoreProjectEnd()
-{
-    const std::optional<double> end = endBeforePreview();
-    if (!end)
-        return;
-    requireOk(m_document->setProjectEnd(std::max(*end, 0.0)));
-    m_model.removeProperty(core::PropertyKey::ProjectEnd);
-    m_endBeforePreview.reset();
-}
-
-std::optional<double> Project::endBeforePreview() const
-{
-    core::Variant end;
-    if (m_endBeforePreview || m_model.getProperty(core::PropertyKey::ProjectEnd, end) != Result::Ok)
-        return m_endBeforePreview;
-    return end.toDouble();
+    return end;
 }
 
 bool Project::isWanted(const Track& track) const
@@ -421,15 +420,16 @@ void Project::copyRange(const std::vector<const Track*>& tracks, double start, d
 {
     m_indexes.clear();
     const double origin = timeOrigin();
-    requireOk(required(service<IEditService>(m_hostContext))
-                  ->copyRange(m_document, listOf(tracks).get(), 0, start - origin, end - origin, destination - origin));
+    requireOk(
+        required(service<IEditService>(m_hostContext))
+            ->copyRange(m_document.get(), listOf(tracks).get(), 0, start - origin, end - origin, destination - origin));
 }
 
 void Project::deleteRange(IEditTransaction& transaction, double start, double end)
 {
     m_indexes.clear();
     const double origin = timeOrigin();
-    requireOk(transaction.deleteRange(m_document, 0, start - origin, end - origin));
+    requireOk(transaction.deleteRange(m_document.get(), 0, start - origin, end - origin));
 }
 
 void Project::tick(std::uint64_t steps)

@@ -112,13 +112,24 @@ void Project::load()
 {
     findLockedTracks();
     FirstFailure failure;
-    failure.ofStep([this] { readModel(); });
-    if (!m_model.isPreviewActive()) {
+    failure.ofStep([this] {
+        try {
+            readModel();
+        } catch (...) {
+            // The model has emptied itself, but for the VFX patterns that it has read.
+            m_model.settings() = core::Settings();
+            throw;
+        }
+    });
+    if (m_model.isPreviewActive()) {
+        findPreviewedTracks();
+    } else {
         // There is no preview that the user could switch off. If a track can't be unlocked here, the next run unlocks
         // it.
         for (Track& track : m_lockedTracks)
             resultOf([&] { track.setLock(false); });
         std::erase_if(m_lockedTracks, [](const Track& track) { return !track.hasLockState(); });
+        resultOf([this] { m_end.putBack(); });
     }
     failure.raise();
 }

@@ -62,14 +62,17 @@ void Project::setTracksLocked(bool lock)
 
 void Project::collectLockTracks()
 {
-    m_lockedTracks.clear();
+    m_lockedTracks = tracksOfTheUser();
+    std::erase_if(m_lockedTracks, [this](const Track& track) { return !isWanted(track) || track.hostLocked(); });
+}
+
+std::vector<Track> Project::tracksOfTheUser()
+{
     findMarkerTracks();
-    const Track video = newVideoTrack();
-    for (const Track& track : cadrelTracks()) {
-        const bool isOwn = isMarkerTrack(track) || track == video;
-        if (!isOwn && isWanted(track) && !track.hostLocked())
-            m_lockedTracks.push_back(track);
-    }
+    std::vector<Track> tracks = cadrelTracks();
+    std::erase_if(
+        tracks, [this, video = newVideoTrack()](const Track& track) { return isMarkerTrack(track) || track == video; });
+    return tracks;
 }
 
 void Project::findLockedTracks()

@@ -53,8 +53,14 @@ void AutomationCurve::fill(IHostContext* context, IEditTransaction& transaction,
 
 void AutomationCurve::hold(IHostContext* context, IEditTransaction& transaction, double start, double end)
 {
+    holdAsAt(start, context, transaction, start, end);
+}
+
+void AutomationCurve::holdAsAt(double time, IHostContext* context, IEditTransaction& transaction, double start,
+                               double end)
+{
     if (!m_points.empty())
-        level(context, transaction, start, end, valueBefore(start));
+        level(context, transaction, start, end, valueBefore(time));
 }
 
 void AutomationCurve::holdBackwards(IHostContext* context, IEditTransaction& transaction, double start, double end)

@@ -49,6 +49,9 @@ public:
     ///                 \_|  |_/                        `-----|
     ///                start  end
     void hold(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end);
+    /// Likewise, with what the curve has come to at another time.
+    void holdAsAt(double time, Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start,
+                  double end);
     /// Has what the curve goes on with at `end` from `start` on, where it steps from what it has come to.
     void holdBackwards(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start,
                        double end);

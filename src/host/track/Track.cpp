@@ -363,10 +363,10 @@ TrackIndex Track::readIndex() const
 std::vector<AutomationCurve> Track::prepareVirginRange() const
 {
     std::vector<AutomationCurve> curves;
-    const auto list = isAlive() ? Counted<IObjectList>::adopt(m_track->getAutomation()) : nullptr;
-    const int32 count = list ? list->count() : 0;
-    for (int32 index = 0; index < count; ++index)
-        curves.emplace_back(required(list->at(index)), timeOrigin());
+    if (!isAlive())
+        return curves;
+    for (const Counted<IProjectNode>& curve : curvesOf(*m_track))
+        curves.emplace_back(curve.get(), timeOrigin());
     return curves;
 }
 

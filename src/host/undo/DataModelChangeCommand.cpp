@@ -30,7 +30,8 @@ DataModelChangeCommand::DataModelChangeCommand(std::wstring name, IEditTransacti
                                                const std::shared_ptr<core::DataModel>& model, IProjectDocument* project,
                                                ByteArchive before, bool commitOnEnd)
     : core::DataModelChangeCommand(std::move(name)),
-      m_transaction(Velmark::Counted<IEditTransaction>::share(&transaction)), m_project(project),
+      m_transaction(Velmark::Counted<IEditTransaction>::share(&transaction)),
+      m_project(Velmark::Counted<IProjectDocument>::share(project)),
       m_step(Velmark::makeCounted<DataModelEditStep>(model, std::move(before))), m_commitOnEnd(commitOnEnd)
 {
     // This comes after everything else that can fail, so that no transaction is left open.
@@ -42,7 +43,7 @@ DataModelChangeCommand::~DataModelChangeCommand()
 {
     m_transaction->addStep(m_step.get());
     if (m_commitOnEnd)
-        m_transaction->commit(m_project, util::HostString(m_name).utf16());
+        m_transaction->commit(m_project.get(), util::HostString(m_name).utf16());
 }
 
 } // namespace cadrel::host

@@ -6,13 +6,10 @@
 #include "host/undo/DataModelEditStep.h"
 #include "velmark/Counted.h"
 #include "velmark/Editing.h"
+#include "velmark/Project.h"
 
 #include <memory>
 #include <string>
-
-namespace Velmark {
-class IProjectDocument;
-}
 
 namespace cadrel::host {
 
@@ -37,7 +34,7 @@ private:
                            core::serialize::ByteArchive before, bool commitOnEnd);
 
     Velmark::Counted<Velmark::IEditTransaction> m_transaction;
-    Velmark::IProjectDocument* m_project;
+    Velmark::Counted<Velmark::IProjectDocument> m_project;
     Velmark::Counted<DataModelEditStep> m_step;
     bool m_commitOnEnd;
 };

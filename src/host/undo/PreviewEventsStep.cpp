@@ -14,6 +14,7 @@ Velmark::int32 PreviewEventsStep::swap()
         const auto list = m_list.lock();
         if (!list)
             throw util::Result::NotAvailable;
+        // The step has changed sides before those are told who may throw.
         Events present = list->release();
         list->append(std::exchange(m_other, std::move(present)));
     });

@@ -559,7 +559,42 @@ TEST_F(KeepPlannerTest, AGivenChangeEdlIsTakenAsItIsWithinTheHullOfBothSides)
     EXPECT_FALSE(plan.refusal);
     EXPECT_EQ(linesOf(plan.events), (Lines{"60..70 to 20..30: cut", "10..20 to 30..40: cut"}));
     EXPECT_EQ(hullOf(plan), "10..70");
-    EXPECT_EQ(linesOf(plan.lost), Lines());
+}
+
+//  SRC    |-- 1 --|      |-- 2 --|
+//  DST    |-- 1 --|-- 2 --|
+TEST_F(KeepPlannerTest, WhatStandsInAGapOfTheSourcesOfAGivenChangeEdlIsToldAsLostAndNotInTheWay)
+{
+    EventList changes;
+    changes.add(makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:10:00", "00:00:20:00"));
+    changes.add(makeEvent("C", "00:00:30:00", "00:00:40:00", "00:00:20:00", "00:00:30:00"));
+
+    const KeepPlan plan = KeepPlanner(contextWith({{0, 22}, {25, 28}, {29, 50}})).planGiven(changes);
+
+    EXPECT_FALSE(plan.refusal);
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"20..30"})); // told once, from the first to the last
+    EXPECT_EQ(linesOf(KeepPlanner(contextWith({{0, 20}, {25, 28}, {30, 50}})).planGiven(changes).lost),
+              (Lines{"25..28"}));
+    EXPECT_EQ(linesOf(KeepPlanner(contextWith({{0, 20}, {30, 50}})).planGiven(changes).lost), Lines());
+}
+
+//  SRC    |-- 1 --|
+//  DST                    |-- 1 --|
+TEST_F(KeepPlannerTest, WhatStandsBetweenTheOldAndTheNewPlaceOfAGivenChangeEdlIsInTheWay)
+{
+    EventList changes;
+    changes.add(makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:40:00", "00:00:50:00"));
+    const auto planWith = [&](const SecondsRange& material) {
+        return KeepPlanner(contextWith({{10, 20}, material})).planGiven(changes);
+    };
+
+    ASSERT_TRUE(planWith({20, 21}).refusal);
+    EXPECT_EQ(planWith({20, 21}).refusal->reason, KeepRefusal::MaterialInTheWay);
+    EXPECT_EQ(planWith({20, 21}).refusal->amount(), 1);
+    EXPECT_EQ(linesOf(planWith({25, 45}).lost), (Lines{"25..45"}));
+    EXPECT_TRUE(planWith({49, 60}).refusal);
+    EXPECT_FALSE(planWith({50, 60}).refusal);
+    EXPECT_FALSE(planWith({5, 10}).refusal);
 }
 
 TEST_F(KeepPlannerTest, MaterialInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
@@ -578,6 +613,70 @@ TEST_F(KeepPlannerTest, MaterialInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
     EXPECT_FALSE(forced.refusal);
     EXPECT_EQ(linesOf(forced.lost), (Lines{"20..22", "24..25"}));
     EXPECT_EQ(hullOf(forced), "10..25");
+}
+
+//  old    |-- A --|- BL -|-- B --|
+//  new    |-- A --|-- B --|- BL -|
+TEST_F(KeepPlannerTest, SoundInBlackThatFindsNoRoomBesideItsPictureGoesWhereTheChangeEdlSendsTheBlack)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("BL", 0, 20).shot("B", 0, 50);
+    const Film after = Film().at(1000).shot("A", 0, 100).shot("B", 0, 50).shot("BL", 0, 20);
+
+    const KeepPlan plan = planFor(before, after, {{1000, 1170}});
+
+    EXPECT_EQ(linesOf(plan.lost), Lines());
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1120..1170 to 1100..1150: cut", "1100..1120 to 1150..1170: black"}));
+}
+
+//  old    |-- A --|-- X --|  sound  |-- B --|
+//  new    |-- A --|  sound  |-- B --|
+TEST_F(KeepPlannerTest, SoundInBlackBehindALiftedShotGoesAlongWithTheShotAfterIt)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("X", 0, 30).black(10).shot("B", 0, 50);
+    const Film after = Film().at(1000).shot("A", 0, 100).black(10).shot("B", 0, 50);
+
+    const KeepPlan plan = planFor(before, after, {{1130, 1140}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1130..1190 to 1100..1160: black cut"}));
+    EXPECT_EQ(hullOf(plan), "1100..1190");
+    EXPECT_EQ(linesOf(plan.lost), Lines());
+}
+
+TEST_F(KeepPlannerTest, WhatWouldStayIsLostWhereNewPictureIsPushedOverIt)
+{
+    const Film after = filmOfAAndB().shot("C", 0, 71);
+
+    // The reel ends at 1150; from 1210 on material doesn't belong to it any more.
+    EXPECT_EQ(linesOf(planFor(filmOfAAndB(), after, {{1210, 1230}}).lost), (Lines{"1210..1221"}));
+    EXPECT_EQ(linesOf(planFor(filmOfAAndB(), after, {{1221, 1230}}).lost), Lines());
+}
+
+TEST_F(KeepPlannerTest, WhatTheUserPreservesCanLeaveNothingToDoThoughThePictureHasChanged)
+{
+    const Film after = Film().at(1000).shot("A", 0, 100).shot("X", 0, 10).shot("B", 0, 50);
+    KeepContext context = contextWith();
+    const auto planWith = [&](const SecondsRange& preserve) {
+        context.preserve = preserve;
+        return KeepPlanner(context).plan(filmOfAAndB().list(), after.list(), EventList());
+    };
+
+    EXPECT_TRUE(planWith({0, 1100}).isHeldBack);
+    EXPECT_EQ(hullOf(planWith({0, 1100})), "none");
+    EXPECT_FALSE(planWith({0, 1101}).isHeldBack);
+    context.preserve.reset();
+    EXPECT_FALSE(KeepPlanner(context).plan(after.list(), after.list(), EventList()).isHeldBack);
+}
+
+TEST_F(KeepPlannerTest, BlackOfWhichMoreFindsRoomBesideItsPictureDoesNotFollowTheChangeEdl)
+{
+    // All black has the same source, so that the change EDL can send it anywhere.
+    const Film before =
+        Film().at(1000).shot("A", 0, 100).shot("BL", 0, 20).shot("B", 0, 50).shot("BL", 0, 20).shot("C", 0, 50);
+    const Film after = Film().at(1005).append(before, 1000);
+
+    const KeepPlan plan = planFor(before, after, {{1000, 1240}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1000..1240 to 1005..1245: cut black cut black cut"}));
 }
 
 TEST_F(KeepPlannerTest, AGivenChangeEdlWithoutAUsableEventNeedsNoRun)

@@ -25,6 +25,8 @@ public:
     }
 
     bool removes = true;
+    bool closes = true;
+    bool deletes = true;
     std::function<void()> beforeDelete = [] {};
     std::function<bool(Velmark::IEditStep*)> addsStep = [](Velmark::IEditStep*) { return true; };
 
@@ -36,7 +38,7 @@ public:
     Velmark::int32 closeRange(Velmark::IProjectDocument* project, Velmark::IObjectList* tracks, double start,
                               double end, double reserved) override
     {
-        return m_service->closeRange(project, tracks, start, end, reserved);
+        return closes ? m_service->closeRange(project, tracks, start, end, reserved) : Refused;
     }
 
     Velmark::int32 begin(bool flag) override { return m_transaction->begin(flag); }
@@ -70,7 +72,7 @@ public:
                                double end) override
     {
         beforeDelete();
-        return m_transaction->deleteRange(project, reserved, start, end);
+        return deletes ? m_transaction->deleteRange(project, reserved, start, end) : Refused;
     }
     Velmark::int32 addStep(Velmark::IEditStep* step) override
     {
@@ -78,6 +80,8 @@ public:
     }
 
 private:
+    static constexpr Velmark::int32 Refused = 2;
+
     Velmark::Counted<Velmark::IEditService> m_service;
     Velmark::Counted<Velmark::IEditTransaction> m_transaction;
 };

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
 
 #include "core/cut/Cut.h"
@@ -124,6 +125,14 @@ protected:
     Result::Type complete()
     {
         return edit([](Project& project, IEditTransaction& transaction) { project.completeApply(transaction); });
+    }
+
+    /// What stands in the preview now is the system's, and what will be there.
+    void keepAsWritten()
+    {
+        for (const Track& written : host.adapter.cadrelTracks())
+            PreviewRecord::ofContent(written, Day - host.origin).keepOn(host.context(), written);
+        host.adapter.startWriting();
     }
 
     /// The track of that name in the folder of the marker tracks.
@@ -590,6 +599,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunReplacesItsRangeAlone)
     settings().setRestrictRange(true);
     settings().setPreserveMaterial(3610.0, 3620.0);
 
+    keepAsWritten();
     EXPECT_EQ(complete(), Result::Ok);
 
     EXPECT_EQ(contentOf(fx), (Content{"before 0-9", "across 9-10", "new 10-20", "behind 20-30"}));
@@ -635,6 +645,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunThatIsMadeAgainPilesUpNoMarkers)
 
     for (int run = 0; run < 3; ++run) {
         host.addRangeMarker(destinations, u"new", film(Day + 16.0), film(Day + 24.0));
+        keepAsWritten();
         EXPECT_EQ(complete(), Result::Ok);
         Content content = contentOf(destinations);
         std::ranges::sort(content);
@@ -651,6 +662,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunMayBeginBeforeTheClock)
     settings().setRestrictRange(true);
     settings().setPreserveMaterial(-100.0, 3620.0);
 
+    keepAsWritten();
     EXPECT_EQ(complete(), Result::Ok);
 
     EXPECT_EQ(contentOf(fx), (Content{"new 7-20", "behind 20-30"}));
@@ -682,6 +694,7 @@ TEST_P(ProjectEditsTest, AnEmptyRangeReplacesNothing)
     settings().setRestrictRange(true);
     settings().setPreserveMaterial(3610.0, 3610.0);
 
+    keepAsWritten();
     EXPECT_EQ(complete(), Result::Ok);
 
     EXPECT_EQ(contentOf(fx), Content{"old 5-15"});
@@ -728,13 +741,15 @@ TEST_P(ProjectEditsTest, ClearsThePreviewAndUnlocksTheTracks)
     addClip(fx, u"old", 5.0, 15.0);
     addClip(fx, u"across", Day - 3601.0, Day - 3599.0);
     addClip(fx, u"new", Day + 20.0, Day + 30.0);
+    keepAsWritten();
+    addClip(fx, u"late", Day + 25.0, Day + 35.0);
     host.adapter.collectLockTracks();
     host.adapter.setTracksLocked(true);
 
     EXPECT_EQ(edit([](Project& project, IEditTransaction& transaction) { project.clearPreview(transaction); }),
               Result::Ok);
 
-    EXPECT_EQ(contentOf(fx), (Content{"old 5-15", "across 82799-82800"}));
+    EXPECT_EQ(contentOf(fx), (Content{"old 5-15", "across 82799-82801", "preview: late 25-35"}));
     EXPECT_FALSE(host.handle(fx).hostLocked());
 }
 
@@ -748,6 +763,7 @@ TEST_P(ProjectEditsTest, ClearsTheAutomationOfThePreviewThatReachesFurtherThanAl
     host.addPoint(fx, volume, film(Day + 900.0), 0.25F);
     host.addPoint(fx, volume, film(Day + 901.0), 0.75F);
     host.addPoint(fx, volume, film(Day + 902.0), 0.25F);
+    keepAsWritten();
 
     EXPECT_EQ(edit([](Project& project, IEditTransaction& transaction) { project.clearPreview(transaction); }),
               Result::Ok);
@@ -757,13 +773,17 @@ TEST_P(ProjectEditsTest, ClearsTheAutomationOfThePreviewThatReachesFurtherThanAl
         EXPECT_EQ(curve.valueBehind(film(time)), 0.25) << time;
 }
 
-TEST_P(ProjectEditsTest, ThePreviewCannotBeClearedWithoutOffsetOrTransaction)
+TEST_P(ProjectEditsTest, ThePreviewIsClearedInATransactionAloneAndWhereverThePreviewOffsetIs)
 {
+    const auto fx = addTrack(u"FX");
+    addClip(fx, u"new", Day + 20.0, Day + 30.0);
+    keepAsWritten();
     EXPECT_EQ(thrownBy([&] { host.adapter.clearPreview(*host.transaction()); }), Result::HostCallFailed);
 
     host.adapter.resetPreviewOffset();
     EXPECT_EQ(edit([](Project& project, IEditTransaction& transaction) { project.clearPreview(transaction); }),
-              Result::NotAvailable);
+              Result::Ok);
+    EXPECT_EQ(contentOf(fx), Content());
 }
 
 TEST_P(ProjectEditsTest, ClosesARangeOnTheTracksOfTheRunInTimesOfTheHost)
@@ -1008,11 +1028,7 @@ TEST_P(ProjectVirginTerritoryTest, ARestrictedRunHoldsTheAutomationInItsRange)
     listCuts({{"01:00:10:00", "01:00:20:00"}});
 
     hold();
-    EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
 
-    settings().setPreserveMaterial(3635.0, 3640.0);
-    listCuts({{"01:00:40:00", "01:00:50:00"}});
-    hold();
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
 }
 
@@ -1026,6 +1042,35 @@ TEST_P(ProjectVirginTerritoryTest, ACutIsAsLongAsItsMaterial)
 
     // From 20 s on there is nothing, though the first one is to last longer.
     EXPECT_EQ(points(track), (std::vector<double>{15.0, 20.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, ARestrictedRunKeepsWhatThereIsBeforeItsRange)
+{
+    // The programme itself has 0.2 up to 15 s, where the preview has 0.8 from 25 s on.
+    settings().setRestrictRange(true);
+    settings().setPreserveMaterial(3626.0, 3640.0);
+    listCuts({{"01:00:30:00", "01:00:40:00"}});
+
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 26.0, 26.0, 30.0, 30.0, 35.0, 45.0}));
+
+    // Nothing of a cut before the range comes into the programme.
+    listCuts({{"01:00:10:00", "01:00:24:00"}, {"01:00:30:00", "01:00:40:00"}});
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 26.0, 26.0, 30.0, 30.0, 35.0, 45.0}));
+}
+
+TEST_P(ProjectVirginTerritoryTest, ARestrictedRunWithoutCutsKeepsWhatThereIsBeforeItsRange)
+{
+    settings().setRestrictRange(true);
+    settings().setPreserveMaterial(3630.0, 3640.0);
+    cuts.clear();
+
+    hold(false);
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 35.0, 45.0}));
+
+    hold();
+    EXPECT_EQ(points(track), (std::vector<double>{15.0, 25.0, 30.0, 30.0, 40.0, 40.0, 45.0}));
 }
 
 TEST_P(ProjectVirginTerritoryTest, OfLockedAndUnselectedTracksNoAutomationIsHeld)

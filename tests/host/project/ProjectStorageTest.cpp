@@ -293,6 +293,16 @@ TEST_F(ProjectStorageTest, ABlockThatBreaksOffGivesAnEmptyModel)
     }
 }
 
+TEST_F(ProjectStorageTest, ABlockThatBreaksOffLeavesNoVfxPatternBehind)
+{
+    host.adapter.model().settings().setVfxPattern(core::VfxPatternEntry("VFX_", "_comp", true), 1);
+    const Bytes block = contentOf(host.adapter.model());
+    for (std::size_t size = 0; size < block.size(); ++size) {
+        store(Bytes(block.begin(), block.begin() + static_cast<std::ptrdiff_t>(size)));
+        ASSERT_EQ(loadFailure(), Result::EndOfData) << "after " << size << " bytes";
+    }
+}
+
 TEST_F(ProjectStorageTest, AChecksumThatIsMissingCannotBeRead)
 {
     store(contentOf(host.adapter.model()));

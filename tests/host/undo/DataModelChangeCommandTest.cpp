@@ -196,6 +196,19 @@ TEST_F(DataModelChangeCommandTest, AddsItsStepAndCommitsUnderTheNameInUtf16)
     EXPECT_EQ(query<FObject>(transaction->step)->refCount(), 2) << "The transaction's and the one that asks.";
 }
 
+TEST_F(DataModelChangeCommandTest, HoldsTheProjectForWhichItCommits)
+{
+    const auto transaction = makeCounted<RecordingTransaction>();
+    const auto before = host.project.refCount();
+
+    {
+        const DataModelChangeCommand command(L"Load New EDL", *transaction, shared, host.document());
+        EXPECT_EQ(host.project.refCount(), before + 1);
+    }
+
+    EXPECT_EQ(host.project.refCount(), before);
+}
+
 TEST_F(DataModelChangeCommandTest, AddsNothingButItsStepToAnOpenEdit)
 {
     const auto transaction = makeCounted<RecordingTransaction>();

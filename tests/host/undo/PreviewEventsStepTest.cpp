@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <stdexcept>
 
 namespace cadrel::host::tests {
 
@@ -41,6 +42,26 @@ TEST(PreviewEventsStep, RefusesWhenItsListIsGone)
 
     EXPECT_EQ(step->undo(), util::Result::NotAvailable);
     EXPECT_EQ(step->redo(), util::Result::NotAvailable);
+}
+
+TEST(PreviewEventsStep, HasChangedSidesWhateverThoseWhoAreToldThrow)
+{
+    struct Thrower : core::ChangeContextListenerInterface {
+        void onChange(const core::ChangeContext&) override { throw std::runtime_error("told"); }
+    };
+    const auto first = std::make_shared<core::EventBase>();
+    const auto second = std::make_shared<core::EventBase>();
+    const auto list = std::make_shared<core::EventList>();
+    list->add(second);
+    const auto step = Velmark::makeCounted<PreviewEventsStep>(list, Events{first});
+    Thrower thrower;
+    list->addListener(&thrower);
+
+    EXPECT_EQ(step->undo(), util::Result::NotAvailable);
+    EXPECT_EQ(list->events(), Events{first});
+    EXPECT_EQ(step->redo(), util::Result::NotAvailable);
+    EXPECT_EQ(list->events(), Events{second});
+    list->removeListener(&thrower);
 }
 
 TEST(PreviewEventsStep, IsPartOfItsEntryAndNothingMore)

@@ -55,6 +55,7 @@ protected:
     fs::path path() const { return m_folder / "reel.stage"; }
     std::string content() const { return contentOf(path()); }
 
+    const Counted<Project>& newProject() const { return m_new; }
     void save() const { ProjectFile::write(*m_new, path()); }
     /// Empty when it succeeds.
     std::string faultOfSaving(const fs::path& file) const
@@ -94,6 +95,24 @@ TEST_F(ProjectFileSaving, PutsTheNewFileInThePlaceOfTheFormer)
     EXPECT_EQ(content(), newText);
     EXPECT_NE(newText, formerText);
     EXPECT_EQ(folder().names(), Names{"reel.stage"});
+}
+
+TEST_F(ProjectFileSaving, RefusesAFileThatAnotherProgramHasSavedSince)
+{
+    const cadrel::util::FileStamp stamp = cadrel::util::FileStamp::of(path());
+    folder().write("other.stage", "of another program");
+    fs::rename(folder() / "other.stage", path());
+
+    try {
+        ProjectFile::write(*newProject(), path(), stamp);
+        FAIL();
+    } catch (const ProjectFileChanged& error) {
+        EXPECT_EQ(std::string(error.what()), path().string() + ": another program has written it meanwhile");
+    }
+    EXPECT_EQ(content(), "of another program");
+    EXPECT_EQ(folder().names(), Names{"reel.stage"});
+    ProjectFile::write(*newProject(), path(), cadrel::util::FileStamp::of(path()));
+    EXPECT_EQ(content(), newText);
 }
 
 TEST_F(ProjectFileSaving, LeavesOneWholeFileWhereverItIsKilled)

@@ -2,6 +2,7 @@
 
 #include "tests/support/standin/TestHost.h"
 
+#include "standin/project/AutomationPoint.h"
 #include "standin/project/Track.h"
 #include "velmark/Automation.h"
 #include "velmark/Tracks.h"
@@ -123,6 +124,19 @@ TEST(AutomationPoint, HasAValueFromZeroToOne)
         EXPECT_NE(point->setValue(value), ResultOk) << value;
 
     EXPECT_EQ(point->getValue(), 1.0f);
+}
+
+TEST(AutomationPoint, TakesAValueOf32BitsForTheShortNumberThatItStandsFor)
+{
+    TestHost host;
+    const auto counted = create<IAutomationPoint>(host.context(), ClassId::AutomationPoint);
+    auto* const point = dynamic_cast<AutomationPoint*>(counted.get());
+    ASSERT_NE(point, nullptr);
+    for (const double number : {0.1, 0.7, 0.333, 0.251189, 0.0, 1.0, 0.5}) {
+        EXPECT_EQ(counted->setValue(static_cast<float>(number)), ResultOk);
+        EXPECT_EQ(point->value(), number);
+        EXPECT_EQ(counted->getValue(), static_cast<float>(number));
+    }
 }
 
 TEST(AutomationPoint, StandsAtATimeAndHasNoLength)

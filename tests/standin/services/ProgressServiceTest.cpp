@@ -106,15 +106,22 @@ TEST_F(ProgressServiceTest, MovesOnByTicksAndToPositions)
     EXPECT_EQ(drawn(), "|Cadrel:  25% (2 of 8) Work");
 }
 
-TEST_F(ProgressServiceTest, BeginsEachStageAtItsStart)
+TEST_F(ProgressServiceTest, GoesOnInEachStageFromWhereTheFormerOneStood)
 {
     start(8);
     progress->tick(6);
     drawn();
 
     progress->setRange(5);
-
-    EXPECT_EQ(drawn(), "|Cadrel:   0% (0 of 5) Work");
+    EXPECT_EQ(drawn(), "|Cadrel:  75% (0 of 5) Work");
+    progress->tick(2);
+    EXPECT_EQ(drawn(), "|Cadrel:  85% (2 of 5) Work");
+    progress->tick(3);
+    EXPECT_EQ(drawn(), "|Cadrel: 100% (5 of 5) Work");
+    progress->setRange(4);
+    EXPECT_EQ(drawn(), "|Cadrel: 100% (0 of 4) Work");
+    progress->tick(2);
+    EXPECT_EQ(drawn(), "");
 }
 
 TEST_F(ProgressServiceTest, StopsAtTheEndOfTheStage)

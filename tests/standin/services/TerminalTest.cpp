@@ -78,6 +78,17 @@ TEST(Terminal, CutsTheProgressToALineByCharacters)
     EXPECT_EQ(drawn(std::u16string(80, u'x')), "\r\033[K" + std::string(79, 'x'));
 }
 
+TEST(Terminal, CutsTheProgressToTheLineOfANarrowTerminal)
+{
+    std::ostringstream out;
+    Terminal terminal(out, true, nullptr, 5);
+
+    terminal.drawProgress(u"12345");
+    terminal.drawProgress(u"123456");
+
+    EXPECT_EQ(out.str(), "\r\033[K12345\r\033[K12345");
+}
+
 TEST(Terminal, MakesRoomForAMessage)
 {
     std::ostringstream out;

@@ -19,6 +19,8 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr std::int32_t DropFrame = 1;
+/// Of an EDL that shows no rate.
+constexpr std::int32_t FilmRate = 24;
 
 void require(util::Result::Type result, const std::string& path)
 {
@@ -47,7 +49,8 @@ TreeEdl::TreeEdl(const std::string& path, bool acceptAudio)
     const std::wstring file = widePath(treePath(path));
     core::Framerate shown;
     require(core::fileio::CmxParser().detect(file, shown), path);
-    m_project.framerate = core::Framerate(shown.framesPerSecond, shown.dropFrame == DropFrame ? DropFrame : 0);
+    m_project.framerate = core::Framerate(shown.framesPerSecond == 0 ? FilmRate : shown.framesPerSecond,
+                                          shown.dropFrame == DropFrame ? DropFrame : 0);
     require(core::fileio::CmxParser().parse(file, m_events, shown, acceptAudio), path);
 }
 

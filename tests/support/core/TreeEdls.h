@@ -15,7 +15,7 @@ namespace cadrel::tests {
 /// the examples, as paths from the root of the tree, in alphabetical order.
 std::vector<std::string> treeEdls();
 
-/// An EDL of the tree, read under the rate that it shows. A project of that rate is open as long as it lives.
+/// An EDL of the tree, read under the rate that it shows, or at 24 frames a second if it shows none. A project of that rate is open as long as it lives.
 ///
 ///     for (const std::string& path : treeEdls()) {
 ///         SCOPED_TRACE(path);

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/console/JsonOutput.h"
+#include "app/console/Output.h"
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
@@ -14,7 +14,7 @@ namespace cadrel::app {
 
 using util::Result;
 
-JsonOutput::JsonOutput(const std::string& path) : m_path(path)
+Output::Output(const std::string& path) : m_path(path)
 {
     if (isStandardOutput(path))
         return;
@@ -24,7 +24,7 @@ JsonOutput::JsonOutput(const std::string& path) : m_path(path)
 
 /// Does what fails when the file can't be written.
 template <class Action>
-void JsonOutput::orUnwritable(Action action)
+void Output::orUnwritable(Action action)
 {
     try {
         action();
@@ -33,7 +33,7 @@ void JsonOutput::orUnwritable(Action action)
     }
 }
 
-void JsonOutput::write(std::string_view text)
+void Output::write(std::string_view text)
 {
     Interruption::check();
     if (m_file)
@@ -42,18 +42,19 @@ void JsonOutput::write(std::string_view text)
         std::cout << text;
 }
 
-void JsonOutput::finish()
+void Output::finish()
 {
     if (m_file)
-        orUnwritable([&] { m_file->putInPlace(); });
+        orUnwritable([&] { m_file->finish(); });
     else
         flushStandardOutput();
 }
 
-void JsonOutput::keep()
+void Output::place()
 {
+    finish();
     if (m_file)
-        m_file->keep();
+        orUnwritable([&] { m_file->commit(); });
 }
 
 void flushStandardOutput()

@@ -10,20 +10,21 @@
 
 namespace cadrel::app {
 
-/// Where `--json` goes: standard output for "-", else a file, which appears only when all of it is written and is
-/// removed again unless it is kept. Every failure is thrown as Failure.
-class JsonOutput {
+/// Where a document goes: standard output for "-", else a file, which takes its place only when all of it is written. A file
+/// that isn't put in its place is removed again. Every failure is thrown as Failure.
+class Output {
 public:
     static bool isStandardOutput(const std::string& path) { return path == "-"; }
     /// Whether the user wants it, and in a file.
     static bool isFile(const std::string& path) { return !path.empty() && !isStandardOutput(path); }
 
-    explicit JsonOutput(const std::string& path);
+    explicit Output(const std::string& path);
 
     void write(std::string_view text);
-    /// Ends the writing.
+    /// Ends the writing; then all of it is on the disk, and what stood in its place still stands there.
     void finish();
-    void keep();
+    /// Finishes, and puts the file in its place.
+    void place();
 
 private:
     template <class Action>

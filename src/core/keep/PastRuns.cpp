@@ -1,0 +1,216 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/keep/PastRuns.h"
+
+#include "core/change/ChangeEdlGenerator.h"
+#include "core/edl/EventBase.h"
+#include "core/keep/ChangeStretch.h"
+#include "core/keep/PictureComparison.h"
+#include "core/keep/PictureLine.h"
+#include "core/keep/PictureNames.h"
+#include "core/keep/Reels.h"
+#include "core/serialize/ByteArchive.h"
+#include "util/Result.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace cadrel::core {
+
+using serialize::ByteArchive;
+using util::Result;
+
+namespace {
+
+/// The stretches of a change EDL, in order; those that go on alike are one.
+std::vector<ChangeStretch> stretchesOf(const EventList& changes, const Framerate& framerate)
+{
+    std::vector<ChangeStretch> joined;
+    for (const ChangeStretch& stretch : unhealedStretches(changes, framerate)) {
+        const bool goesOn = !joined.empty() && joined.back().shift == stretch.shift &&
+                            joined.back().destination.end == stretch.destination.start;
+        if (goesOn)
+            joined.back().destination.end = stretch.destination.end;
+        else
+            joined.push_back(stretch);
+    }
+    return joined;
+}
+
+bool isSame(const ChangeStretch& a, const ChangeStretch& b)
+{
+    return a.destination == b.destination && a.shift == b.shift;
+}
+
+FrameRanges hullOf(const EventList& changes, const Framerate& framerate)
+{
+    FrameRanges all;
+    for (const ChangeStretch& stretch : stretchesOf(changes, framerate)) {
+        all.push_back(stretch.source());
+        all.push_back(stretch.destination);
+    }
+    all = united(std::move(all));
+    if (all.empty())
+        return {};
+    return {{all.front().start, all.back().end}};
+}
+
+FrameRanges both(FrameRanges a, const FrameRanges& b)
+{
+    a.insert(a.end(), b.begin(), b.end());
+    return united(std::move(a));
+}
+
+/// The events as a project stores them, which keeps no comments and so not the text of what can't be read.
+EventList asStored(const EventList& events)
+{
+    ByteArchive archive;
+    archive << events;
+    EventList stored;
+    archive >> stored;
+    return stored;
+}
+
+FrameRanges reelsOf(const FrameRanges& lit, const Framerate& framerate)
+{
+    return joinedWithin(partingGap(framerate), lit);
+}
+
+/// The first frame of a reel at which `standing` and `given` differ, if the given cut is the one that the run began with.
+std::optional<std::int32_t> differenceOfRepeatedRun(const PictureLine& began, const PictureLine& standing,
+                                                    const PictureLine& given, const FrameRange& reel)
+{
+    const bool isGivenAgain =
+        PictureComparison(began, given).differencesUnder(0, reel).empty() && !within(reel, given.lit()).empty();
+    const FrameRanges differences = PictureComparison(standing, given).differencesUnder(0, reel);
+    return isGivenAgain && !differences.empty() ? std::optional(differences.front().start) : std::nullopt;
+}
+
+} // namespace
+
+void PastRuns::add(const EventList& oldCut, const EventList& newCut, const EventList& changes)
+{
+    Run run = runOf(oldCut, newCut, changes);
+    if (!run.isOfCuts() && run.changes.isEmpty())
+        return;
+    forgetWithin(run.extent);
+    m_runs.push_back(std::move(run));
+}
+
+void PastRuns::forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes)
+{
+    forgetWithin(runOf(oldCut, newCut, changes).extent);
+}
+
+void PastRuns::forgetWithin(const FrameRanges& extent)
+{
+    std::erase_if(m_runs, [&extent](const Run& run) { return without(run.extent, extent).empty(); });
+}
+
+PastRuns::Run PastRuns::runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes) const
+{
+    Run run{oldCut, newCut, EventList(), {}};
+    if (!run.isOfCuts()) {
+        run.changes = changes;
+        run.extent = hullOf(changes, m_context.framerate);
+        return run;
+    }
+    PictureNames names(m_context.matchBy, m_context.vfxPatterns);
+    const PictureLine oldLine(oldCut, names, m_context.framerate);
+    const PictureLine newLine(newCut, names, m_context.framerate);
+    run.extent = reelsOf(both(oldLine.lit(), newLine.lit()), m_context.framerate);
+    return run;
+}
+
+std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut) const
+{
+    const Framerate& framerate = m_context.framerate;
+    PictureNames names(m_context.matchBy, m_context.vfxPatterns);
+    const PictureLine given(asStored(oldCut), names, framerate);
+    const FrameRanges givenReels = reelsOf(given.lit(), framerate);
+    FrameRanges hidden;
+    for (auto run = m_runs.rbegin(); run != m_runs.rend(); ++run) {
+        if (run->isOfCuts()) {
+            const PictureLine began(asStored(run->oldCut), names, framerate);
+            const PictureLine standing(asStored(run->newCut), names, framerate);
+            const PictureComparison comparison(standing, given);
+            for (const FrameRange& reel : reelsOf(standing.lit(), framerate)) {
+                for (const FrameRange& common : without(within(reel, givenReels), hidden)) {
+                    const FrameRanges differences = comparison.differencesUnder(0, common);
+                    if (!differences.empty())
+                        return differences.front().start;
+                }
+            }
+            for (const FrameRange& reel : without(run->extent, hidden)) {
+                if (const auto difference = differenceOfRepeatedRun(began, standing, given, reel))
+                    return difference;
+            }
+        }
+        hidden = both(std::move(hidden), run->extent);
+    }
+    return std::nullopt;
+}
+
+EventList PastRuns::changesOf(const Run& run) const
+{
+    if (!run.isOfCuts())
+        return run.changes;
+    EventList changes;
+    try {
+        ChangeEdlGenerator generator;
+        generator.configure(m_context.matchBy, m_context.vfxPatterns);
+        generator.generate(run.oldCut, run.newCut, changes);
+    } catch (Result::Type) {
+        changes.clear();
+    }
+    return changes;
+}
+
+bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven) const
+{
+    const std::vector<ChangeStretch> stretches = stretchesOf(changes, m_context.framerate);
+    const FrameRanges hull = hullOf(changes, m_context.framerate);
+    const bool movesAnything = std::any_of(stretches.begin(), stretches.end(),
+                                           [](const ChangeStretch& stretch) { return stretch.shift != 0; });
+    if (!movesAnything)
+        return false;
+    FrameRanges hidden;
+    for (auto run = m_runs.rbegin(); run != m_runs.rend() && without(hull, hidden) == hull; ++run) {
+        const std::vector<ChangeStretch> others = isGiven || !run->isOfCuts()
+                                                      ? stretchesOf(changesOf(*run), m_context.framerate)
+                                                      : std::vector<ChangeStretch>();
+        if (std::equal(stretches.begin(), stretches.end(), others.begin(), others.end(), isSame))
+            return true;
+        hidden = both(std::move(hidden), run->extent);
+    }
+    return false;
+}
+
+std::string PastRuns::toBytes() const
+{
+    ByteArchive archive;
+    archive.writeCount(m_runs.size());
+    for (const Run& run : m_runs)
+        archive << run.oldCut << run.newCut << run.changes;
+    return {archive.data(), archive.data() + archive.size()};
+}
+
+void PastRuns::read(const std::string& bytes)
+{
+    ByteArchive archive;
+    archive.assign(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
+    m_runs.clear();
+    try {
+        for (std::size_t count = archive.readCount(); count > 0; --count) {
+            EventList oldCut;
+            EventList newCut;
+            EventList changes;
+            archive >> oldCut >> newCut >> changes;
+            add(oldCut, newCut, changes);
+        }
+    } catch (Result::Type) {
+        m_runs.clear();
+    }
+}
+
+} // namespace cadrel::core

@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "core/edl/EventList.h"
+#include "core/keep/FrameRange.h"
+#include "core/settings/VfxPatternEntry.h"
+#include "core/time/Framerate.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace cadrel::core {
+
+/// The runs that a project has behind it, and so the cut that its sound stands in. A later run hides what an earlier one
+/// did at the same time of the programme.
+///
+///     first run     |-- reel 1 --|
+///     second run                       |-- reel 2 --|
+///     third run     |-- reel 1 --|                       the first one counts no longer
+class PastRuns {
+public:
+    /// How events are named when two cuts are compared, and the rate of their timecodes.
+    struct Context {
+        std::int32_t matchBy = 0;
+        std::vector<VfxPatternEntry> vfxPatterns;
+        Framerate framerate;
+    };
+
+    explicit PastRuns(Context context) : m_context(std::move(context)) {}
+
+    /// A run after those before it; the lists are as the model had them. Without both cuts it is one of a change EDL that
+    /// was given. A run without events is none. Shares the events.
+    void add(const EventList& oldCut, const EventList& newCut, const EventList& changes);
+    /// Forgets the runs that such a run would hide altogether.
+    void forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes);
+
+    bool isEmpty() const { return m_runs.empty(); }
+    std::size_t size() const { return m_runs.size(); }
+
+    /// The first frame at which the sound stands in another cut than the one given: at which the two differ where both
+    /// have a reel, or where they end when a run began with just the cut that is given.
+    std::optional<std::int32_t> firstDifference(const EventList& oldCut) const;
+    /// Whether a run has carried out this change EDL; one that moves nothing counts as none. A list that was `given` is
+    /// compared with all runs, and one that was made of two cuts only with those of given lists.
+    bool haveCarriedOut(const EventList& changes, bool isGiven) const;
+
+    /// For the model's properties. The reader takes what isn't such bytes for no runs.
+    std::string toBytes() const;
+    void read(const std::string& bytes);
+
+private:
+    struct Run {
+        EventList oldCut;
+        EventList newCut;
+        EventList changes;
+        FrameRanges extent; ///< the reels of both cuts, or the hull of the change EDL
+
+        bool isOfCuts() const { return !oldCut.isEmpty() || !newCut.isEmpty(); }
+    };
+
+    Run runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes) const;
+    void forgetWithin(const FrameRanges& extent);
+    EventList changesOf(const Run& run) const;
+
+    Context m_context;
+    std::vector<Run> m_runs; ///< the earliest first
+};
+
+} // namespace cadrel::core

@@ -1,0 +1,202 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What stands in the preview stretch: what the system has written there, and what the user has laid there.
+
+#include "core/time/SecondsRange.h"
+#include "host/border/FirstFailure.h"
+#include "host/border/HostFailure.h"
+#include "host/border/NodeReading.h"
+#include "host/project/PreviewRecord.h"
+#include "host/project/Project.h"
+#include "host/track/Instant.h"
+#include "velmark/Editing.h"
+
+#include <algorithm>
+#include <set>
+#include <utility>
+
+using namespace Velmark;
+
+namespace cadrel::host {
+
+namespace {
+
+using Node = PreviewRecord::Node;
+
+/// What is taken off its tracks while the stretch around it is emptied.
+class SparedContent {
+public:
+    explicit SparedContent(IEditTransaction& transaction) : m_transaction(transaction) {}
+
+    /// `parent` is a time context.
+    void takeOff(const Counted<FUnknown>& parent, const std::vector<Node>& children)
+    {
+        for (const Node& child : children) {
+            requireOk(m_transaction.remove(parent.get(), child.get()));
+            m_taken.emplace_back(parent, child);
+        }
+    }
+    /// Puts all of it back, and throws the first failure at the end.
+    void putBack()
+    {
+        FirstFailure failure;
+        for (const auto& [parent, child] : std::exchange(m_taken, {}))
+            failure.ofStep([&] { requireOk(m_transaction.insert(parent.get(), child.get())); });
+        failure.raise();
+    }
+
+private:
+    IEditTransaction& m_transaction;
+    std::vector<std::pair<Counted<FUnknown>, Node>> m_taken;
+};
+
+/// The smallest stretch that holds all that the tracks have written down; nothing when there is nothing.
+std::optional<core::SecondsRange> writtenStretch(const std::vector<Track>& tracks)
+{
+    std::optional<core::SecondsRange> stretch;
+    for (const Track& track : tracks) {
+        const std::optional<PreviewRecord> record = PreviewRecord::keptBy(track);
+        if (!record || !record->end())
+            continue;
+        // A range doesn't hold its end, where a point may stand.
+        const core::SecondsRange own{record->start(), *record->end() + 2.0 * core::SameInstant};
+        if (!stretch)
+            stretch = own;
+        *stretch = {std::min(stretch->start, own.start), std::max(stretch->end, own.end)};
+    }
+    return stretch;
+}
+
+std::vector<Node> pointsIn(IProjectNode& curve, const core::SecondsRange& stretch)
+{
+    std::vector<Node> points = childrenOf(curve);
+    std::erase_if(points, [&](const Node& point) {
+        const double time = point->getStart(nullptr);
+        return isBefore(time, stretch.start) || !isBefore(time, stretch.end);
+    });
+    return points;
+}
+
+} // namespace
+
+bool Project::hasWritten()
+{
+    return std::ranges::any_of(cadrelTracks(), PreviewRecord::isKeptBy);
+}
+
+void Project::startWriting()
+{
+    ensurePreviewOffset();
+    m_writingFrom = requiredOffset() - timeOrigin();
+}
+
+void Project::rememberWritten()
+{
+    const std::optional<double> start = std::exchange(m_writingFrom, std::nullopt);
+    if (!start)
+        return;
+    FirstFailure failure;
+    for (const Track& track : cadrelTracks()) {
+        failure.ofStep([&] {
+            const PreviewRecord record = PreviewRecord::ofContent(track, *start);
+            if (record.end() || std::ranges::find(m_lockedTracks, track) != m_lockedTracks.end())
+                record.keepOn(m_hostContext, track);
+        });
+    }
+    failure.raise();
+}
+
+//     before     film |=====|        preview |-- copy --|-- copy --|
+//                                        |= user's =|                  |= user's =|
+//     after      film |=====|            |= user's =|                  |= user's =|
+void Project::clearPreview(IEditTransaction& transaction)
+{
+    setTracksLocked(false);
+    const std::vector<Track> tracks = cadrelTracks();
+    if (const auto stretch = writtenStretch(tracks)) {
+        SparedContent spared(transaction);
+        FirstFailure failure;
+        failure.ofStep([&] {
+            for (const Track& track : tracks) {
+                spared.takeOff(track.container(), usersEvents(track, *stretch));
+                const std::optional<PreviewRecord> record = PreviewRecord::keptBy(track);
+                if (record && record->end()) {
+                    removePoints(transaction, track, *stretch);
+                    continue;
+                }
+                for (const Node& curve : curvesOf(*track.node()))
+                    spared.takeOff(curve, pointsIn(*curve, *stretch));
+            }
+            deleteRange(transaction, stretch->start + timeOrigin(), stretch->end + timeOrigin());
+        });
+        failure.ofStep([&] { spared.putBack(); });
+        failure.raise();
+    }
+    for (const Track& track : tracks)
+        PreviewRecord::dropFrom(track);
+    m_lockedTracks.clear();
+    m_indexes.clear();
+}
+
+void Project::removePoints(IEditTransaction& transaction, const Track& track, const core::SecondsRange& stretch)
+{
+    for (const Node& curve : curvesOf(*track.node())) {
+        const std::vector<Node> points = childrenOf(*curve);
+        if (points.empty() || !isBefore(points.back()->getStart(nullptr), stretch.end))
+            continue;
+        for (const Node& point : pointsIn(*curve, stretch))
+            requireOk(transaction.remove(curve.get(), point.get()));
+    }
+}
+
+std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRange& stretch)
+{
+    std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
+    if (const auto record = PreviewRecord::keptBy(track))
+        events = record->others(std::move(events));
+    findMarkerTracks();
+    if (track == markerTrack(TrackRole::Memos)) {
+        // What the user has made of the copy of a memo is in the memo itself.
+        std::set<std::int64_t> ids;
+        for (const HostEvent& memo : track.clipEvents()) {
+            if (isBefore(memo.getStart(), stretch.start + timeOrigin()))
+                ids.insert(memo.getUserId());
+        }
+        std::erase_if(events, [&](const Node& event) {
+            const std::int64_t id = HostEvent(track, event).getUserId();
+            return id > 0 && ids.contains(id);
+        });
+    }
+    return events;
+}
+
+void Project::findPreviewedTracks()
+{
+    for (const Track& track : tracksOfTheUser()) {
+        if (PreviewRecord::isKeptBy(track) && std::ranges::find(m_lockedTracks, track) == m_lockedTracks.end())
+            m_lockedTracks.push_back(track);
+    }
+}
+
+std::optional<double> Project::writtenFrom()
+{
+    for (const Track& track : cadrelTracks()) {
+        if (const auto record = PreviewRecord::keptBy(track))
+            return record->start();
+    }
+    return std::nullopt;
+}
+
+double Project::latestPoint(const std::vector<Track>& tracks) const
+{
+    double latest = 0.0;
+    for (const Track& track : tracks) {
+        for (const Node& curve : curvesOf(*track.node())) {
+            for (const Node& point : childrenOf(*curve))
+                latest = std::max(latest, point->getStart(nullptr));
+        }
+    }
+    return latest + timeOrigin();
+}
+
+} // namespace cadrel::host

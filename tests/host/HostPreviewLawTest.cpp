@@ -1,0 +1,309 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// The law of previews, for random projects and whatever the user does meanwhile: once the last one has ended, each of the
+// user's tracks has the bytes that it had before, and beside them what the user himself has laid there.
+
+#include "host/project/Project.h"
+#include "tests/host/RandomRun.h"
+#include "tests/host/project/AlteredEdits.h"
+#include "velmark/Editing.h"
+
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+#include <rapidcheck/gtest.h>
+
+#include <set>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace cadrel::host::tests {
+namespace {
+
+using nlohmann::json;
+
+constexpr double Day = 86400.0;
+
+/// Previews of a random film, and the user beside them.
+class RandomPreviews {
+public:
+    explicit RandomPreviews(Chance& chance) : run(chance), m_chance(chance)
+    {
+        // The change list stays the same, whatever is undone.
+        m_film = filmOf(tracks());
+        m_end = run.project.getEnd(nullptr);
+    }
+
+    void takeStep()
+    {
+        switch (m_chance.below(12)) {
+        case 0:
+            run.adapter->setPreviewActive(true);
+            break;
+        case 1:
+        case 2:
+        case 3:
+            preview();
+            break;
+        case 4:
+            endPreviews();
+            break;
+        case 5:
+            run.adapter->endPreview();
+            break;
+        case 6:
+            lay();
+            break;
+        case 7:
+            for (std::uint64_t count = 1 + m_chance.below(3); count > 0; --count)
+                run.application.edits().undo(run.project);
+            break;
+        case 8:
+            for (std::uint64_t count = 1 + m_chance.below(3); count > 0 && !isRunNext(); --count)
+                run.application.edits().redo(run.project);
+            break;
+        case 9:
+            if (m_chance.oneIn(2))
+                reopen();
+            else
+                moveOrigin();
+            break;
+        case 10:
+            runAndUndo();
+            break;
+        default:
+            failToPreview();
+        }
+    }
+
+    /// What stands in the film is never touched.
+    void expectFilm() { RC_ASSERT(eventsOf(filmOf(tracks())).dump() == eventsOf(m_film).dump()); }
+
+    void endPreviews()
+    {
+        run.adapter->setPreviewActive(false);
+        // What an edit that failed has left.
+        run.adapter->endPreview();
+    }
+
+    void expectAllAsBefore()
+    {
+        std::multiset<std::string> laid;
+        json now = tracks();
+        for (std::size_t index = 0; index < now.size(); ++index) {
+            json others = json::array();
+            for (const json& event : now[index]["events"]) {
+                const std::string name = nameOf(event);
+                if (name.starts_with(Laid))
+                    laid.insert(describe(index, name, event["start"], event["end"]));
+                else
+                    others.push_back(event);
+            }
+            now[index]["events"] = others;
+        }
+        RC_ASSERT(laid == laidByUser());
+        expectSame(now, m_film);
+        if (m_laid.empty())
+            RC_ASSERT(run.project.getEnd(nullptr) == m_end);
+        RC_ASSERT(run.project.hasAttribute(AttributeKey::ProjectEnd) != ResultOk);
+        for (standin::Track* const track : run.project.allTracks())
+            RC_ASSERT(track->hasAttribute(AttributeKey::Preview) != ResultOk);
+    }
+
+    RandomRun run;
+
+private:
+    static void expectSame(const json& now, const json& before)
+    {
+        RC_ASSERT(now.size() == before.size());
+        for (std::size_t index = 0; index < now.size(); ++index)
+            RC_ASSERT(now[index].dump() == before[index].dump());
+    }
+
+    static constexpr const char* Laid = "laid ";
+
+    struct ByUser {
+        std::u16string entry;
+        std::string event;
+    };
+
+    core::EventList someEvents()
+    {
+        core::EventList& changes = run.model().changeEdl();
+        core::EventList events;
+        const std::size_t first = m_chance.below(changes.size());
+        events.append(changes, first, 1 + m_chance.below(changes.size() - first));
+        return events;
+    }
+    void preview()
+    {
+        run.adapter->setPreviewActive(true);
+        RC_ASSERT(run.adapter->startPreview(someEvents(), 0, 0, m_chance.oneIn(4) ? 0 : 1) == Result::Ok);
+        run.application.idle();
+    }
+    /// Whether a redo would carry the film over.
+    bool isRunNext() const
+    {
+        const standin::UndoList& entries = run.project.undoList();
+        return entries.canRedo() && entries.nameAt(entries.doneCount()).starts_with(u"Apply Cadrel");
+    }
+    void runAndUndo()
+    {
+        RC_ASSERT(run.adapter->startCadrel() == Result::Ok);
+        run.application.idle();
+        const standin::UndoList& entries = run.project.undoList();
+        // It fails where the new picture begins before the time origin that has moved.
+        RC_ASSERT(entries.doneCount() > 0 && entries.nameAt(entries.doneCount() - 1).starts_with(u"Apply Cadrel"));
+        RC_ASSERT(run.application.edits().undo(run.project));
+    }
+    void failToPreview()
+    {
+        const auto edits = makeCounted<AlteredEdits>(run.application.context());
+        edits->closes = m_chance.oneIn(2);
+        edits->deletes = !edits->closes && m_chance.oneIn(2);
+        run.context.replace(Velmark::IEditService::iid, edits);
+        if (m_chance.oneIn(2))
+            preview();
+        else
+            run.adapter->endPreview();
+        run.context.unhide(Velmark::IEditService::iid);
+    }
+    void lay()
+    {
+        const Tracks user = run.usersTracks();
+        std::vector<std::size_t> fitting;
+        for (std::size_t index = 0; index < user.size(); ++index) {
+            if (user[index]->kind() == standin::Track::Kind::Audio)
+                fitting.push_back(index);
+        }
+        if (fitting.empty())
+            return;
+        const std::size_t index = m_chance.oneOf(fitting);
+        const std::string name = Laid + std::to_string(m_laid.size());
+        const double start =
+            Day * static_cast<double>(m_chance.below(3)) + static_cast<double>(m_chance.below(4000)) + 2.0 * EndOfFilm;
+        const double end = start + 1.0 + static_cast<double>(m_chance.below(30));
+        const std::u16string entry(name.begin(), name.end());
+        const auto clip = makeCounted<standin::ClipEvent>();
+        clip->setName(entry);
+        clip->setSpan(start, end);
+        standin::EditService& edits = run.application.edits();
+        RC_ASSERT(edits.begin(true) == ResultOk);
+        clip->insertInto(*user[index]);
+        RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
+        m_laid.push_back({entry, describe(index, name, start, end)});
+    }
+    void reopen()
+    {
+        run.project.announceStoring();
+        run.adapter.reset();
+        run.connect();
+    }
+    void moveOrigin()
+    {
+        run.project.setTimeOrigin(static_cast<double>(m_chance.below(60)) * 3600.0);
+        run.application.idle();
+    }
+
+    /// The user's tracks as they are stored, without what says who holds them and what a memo is known by.
+    json tracks()
+    {
+        const json all = json::parse(run.bytes());
+        json found = json::array();
+        collect(all["tracks"], found);
+        return found;
+    }
+    static void collect(const json& stored, json& found)
+    {
+        for (json track : stored) {
+            const std::string kind = track["kind"];
+            if (kind == "folder") {
+                collect(track["tracks"], found);
+                continue;
+            }
+            json& attributes = track["attributes"];
+            if (attributes.is_null())
+                attributes = json::object();
+            if (kind == "ruler" || isOfSystem(kind, attributes))
+                continue;
+            attributes.erase(AttributeKey::LockState);
+            found.push_back(track);
+        }
+    }
+    static bool isOfSystem(const std::string& kind, const json& attributes)
+    {
+        const bool isVideo = kind == "video";
+        const auto role = attributes.find(isVideo ? AttributeKey::VideoType : AttributeKey::MarkerType);
+        if ((!isVideo && kind != "marker") || role == attributes.end() || !role->is_number_integer())
+            return false;
+        const std::int64_t number = role->get<std::int64_t>() & 0xff;
+        return isVideo ? number == TrackRole::NewVideo
+                       : number >= TrackRole::Destination && number <= TrackRole::LastMarker;
+    }
+    static json filmOf(json tracks)
+    {
+        for (json& track : tracks) {
+            json events = json::array();
+            for (const json& event : track["events"]) {
+                if (event["start"] < EndOfFilm)
+                    events.push_back(event);
+            }
+            track["events"] = events;
+        }
+        return tracks;
+    }
+    static json eventsOf(const json& tracks)
+    {
+        json events = json::array();
+        for (const json& track : tracks)
+            events.push_back(track["events"]);
+        return events;
+    }
+    /// A name that is no text is stored as something else, and isn't one of what is laid here.
+    static std::string nameOf(const json& event)
+    {
+        const auto name = event.find("name");
+        return name != event.end() && name->is_string() ? name->get<std::string>() : std::string();
+    }
+    static std::string describe(std::size_t track, const std::string& name, double start, double end)
+    {
+        return std::to_string(track) + ": " + name + " " + std::to_string(start) + "-" + std::to_string(end);
+    }
+    /// Of what the user has laid, what his undo list still has.
+    std::multiset<std::string> laidByUser() const
+    {
+        std::multiset<std::string> events;
+        const standin::UndoList& entries = run.project.undoList();
+        for (std::size_t index = 0; index < entries.doneCount(); ++index) {
+            for (const ByUser& laid : m_laid) {
+                if (laid.entry == entries.nameAt(index))
+                    events.insert(laid.event);
+            }
+        }
+        return events;
+    }
+
+    Chance& m_chance;
+    std::vector<ByUser> m_laid;
+    json m_film;
+    double m_end = 0.0;
+};
+
+} // namespace
+
+RC_GTEST_PROP(HostPreviewLaw, LeavesEachByteOfTheUsersWhateverHeDoesMeanwhile, ())
+{
+    standin::tests::SeededChance chance(someSeed());
+    RandomPreviews previews(chance);
+    RC_PRE(canRun(previews.run));
+
+    for (std::uint64_t count = 2 + chance.below(12); count > 0; --count) {
+        previews.takeStep();
+        previews.expectFilm();
+    }
+    previews.endPreviews();
+
+    previews.expectAllAsBefore();
+}
+
+} // namespace cadrel::host::tests

@@ -1,0 +1,519 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What a preview and a run that has failed take away again, and what of the user's they leave.
+
+#include "host/Host.h"
+#include "host/border/HostFailure.h"
+#include "host/project/Project.h"
+#include "host/track/TrackRole.h"
+#include "standin/project/Track.h"
+#include "tests/host/PreviewedFilm.h"
+#include "tests/host/project/AlteredEdits.h"
+#include "tests/support/ThrownResult.h"
+#include "tests/support/host/WatchedProgress.h"
+#include "velmark/Attributes.h"
+#include "velmark/ClassId.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <functional>
+#include <string>
+#include <string_view>
+
+namespace cadrel::host::tests {
+namespace {
+
+using namespace Velmark;
+using cadrel::tests::thrownBy;
+using util::Result;
+
+/// Two clips of ten seconds that change places, previewed from 86400 s to 86420 s of the film.
+class HostPreviewStretchTest : public PreviewedFilm {
+protected:
+    double previewOffset() { return adapter().getRunState().previewOffset; }
+    void reopen()
+    {
+        host.project.announceStoring();
+        host.disconnect();
+        host.connect();
+    }
+    /// Makes a run or preview fail once it has copied something, and lets it happen.
+    void failWhile(const std::function<void()>& requested)
+    {
+        host.settings().setCreateOverlapMarkers(true);
+        const auto edits = makeCounted<AlteredEdits>(host.context());
+        edits->closes = false;
+        host.altered.replace(IEditService::iid, edits);
+        requested();
+        host.altered.unhide(IEditService::iid);
+    }
+    void failInAPreview()
+    {
+        adapter().setPreviewActive(true);
+        failWhile([&] { host.preview(changes()); });
+        ASSERT_EQ(host.undoNames().back(), u"Preview (incomplete)");
+        ASSERT_EQ(host.contentOf(track).size(), 4U);
+    }
+
+    const Texts film{"one 0-10", "two 10-20"};
+};
+
+INSTANTIATE_TEST_SUITE_P(Origins, HostPreviewStretchTest, testing::Values(0.0, 3600.0));
+
+} // namespace
+
+// What the user lays there while a preview is on.
+
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidPastIt)
+{
+    previewAll();
+    host.addSound(track, u"late", Day + 20.0, Day + 40.0);
+    host.addSound(track, u"later", Day + 1000.0, Day + 1010.0);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "late 86420-86440", "later 87400-87410"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidWithinIt)
+{
+    previewAll();
+    host.addSound(track, u"within", Day + 3.0, Day + 7.0);
+    host.addSound(track, u"over the start", Day - 5.0, Day + 1.0);
+    host.addSound(track, u"over the end", Day + 15.0, Day + 30.0);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "over the start 86395-86401", "within 86403-86407",
+                                            "over the end 86415-86430"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasMadeOfACopy)
+{
+    previewAll();
+    standin::tests::childrenOf(*track)[2]->setEnd(nullptr, 0, Day + host.inHost(4.0));
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86404"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesOtherTracksAsTheyAre)
+{
+    host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
+    dynamic_cast<standin::Track&>(*track).setSelected(true);
+    const Node wild = host.addTrack(TypeWord::Audio, u"Wild");
+    previewAll();
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    host.addSound(wild, u"take", Day + 2.0, Day + 8.0);
+    host.addPoint(wild, volume, Day + host.inHost(3.0), 0.25F);
+    host.addPoint(wild, volume, Day + host.inHost(5.0), 0.75F);
+    host.addPoint(wild, volume, Day + host.inHost(500.0), 0.5F);
+    const auto pointsOf = [&] {
+        std::vector<double> times;
+        for (const Node& point : standin::tests::childrenOf(*host.curveOf(wild, volume)))
+            times.push_back(point->getStart(nullptr));
+        return times;
+    };
+    const std::vector<double> points = pointsOf();
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(wild), Texts{"take 86402-86408"});
+    EXPECT_EQ(pointsOf(), points);
+    EXPECT_EQ(host.contentOf(track), film);
+}
+
+TEST_P(HostPreviewStretchTest, GivesWayToWhatTheUserHasLaidSinceThePreviewBefore)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // shown from 10 s to 20 s
+    host.addSound(track, u"late", Day, Day + 40.0);
+
+    host.preview(secondChange());
+
+    EXPECT_EQ(previewOffset(), 2.0 * Day);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "late 86400-86440", "two 172800-172810"}));
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(previewOffset(), Day);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "late 86400-86440", "one 86410-86420"}));
+    ASSERT_TRUE(host.redo());
+
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "late 86400-86440"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidThereWhenItsEndIsRefusedAtFirst)
+{
+    previewAll();
+    host.addSound(track, u"within", Day + 3.0, Day + 7.0);
+    const Texts before = host.contentOf(track);
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->deletes = false;
+    host.altered.replace(IEditService::iid, edits);
+
+    EXPECT_EQ(adapter().endPreview(), Result::HostCallFailed);
+    EXPECT_EQ(host.undoNames().back(), u"Delete Preview Range (incomplete)");
+    EXPECT_EQ(host.contentOf(track), before);
+
+    host.altered.unhide(IEditService::iid);
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "within 86403-86407"}));
+}
+
+TEST_P(HostPreviewStretchTest, EndsWhereItWasWrittenWhenTheTimeOriginHasMovedMeanwhile)
+{
+    for (const double shift : {Day, 2.0 * Day, 10.0, -host.origin}) {
+        SCOPED_TRACE(shift);
+        host.disconnect();
+        AdaptedHost moved(GetParam());
+        const Node dialogue = moved.addTrack(TypeWord::Audio, u"DX");
+        moved.addSound(dialogue, u"one", 0.0, 10.0);
+        moved.addSound(dialogue, u"two", 10.0, 20.0);
+        moved.switchMarkersOff();
+        moved.carryOver("01:00:00:00", "01:00:10:00", "01:00:10:00", "01:00:20:00");
+        moved.adapter().setPreviewActive(true);
+        moved.preview(moved.model().changeEdl());
+        ASSERT_EQ(moved.contentOf(dialogue).size(), 3U);
+
+        moved.project.setTimeOrigin(moved.origin + shift);
+        moved.idle();
+        moved.preview(moved.model().changeEdl());
+        EXPECT_EQ(moved.undoNames().back(), u"Preview");
+        moved.adapter().setPreviewActive(false);
+
+        EXPECT_EQ(moved.contentOf(dialogue), film);
+    }
+}
+
+TEST_P(HostPreviewStretchTest, StandsPastAutomationToo)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    host.addPoint(track, volume, host.inHost(5.0), 0.5F);
+    host.addPoint(track, volume, Day + host.inHost(5.0), 0.25F);
+    host.addPoint(track, volume, Day + host.inHost(6.0), 0.75F);
+    const std::string before = host.dump();
+
+    previewAll();
+    EXPECT_EQ(previewOffset(), 2.0 * Day);
+    adapter().setPreviewActive(false);
+
+    const auto& curve = dynamic_cast<standin::Envelope&>(*host.curveOf(track, volume));
+    EXPECT_EQ(curve.valueBehind(Day + host.inHost(5.0)), 0.25);
+    EXPECT_EQ(curve.valueBehind(Day + host.inHost(6.0)), 0.75);
+}
+
+TEST_P(HostPreviewStretchTest, LeavesNoPointOfItsOwnWhoseValueIsRounded)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    host.addPoint(track, volume, host.inHost(5.0), 0.5F);
+    host.addPoint(track, volume, host.inHost(7.0), 0.1F);
+    // Between the two the curve comes to values that no float is.
+    changes().clear();
+    host.carryOver("01:00:05:08", "01:00:06:09", "01:00:10:00", "01:00:11:01");
+    const auto points = [&] { return standin::tests::childrenOf(*host.curveOf(track, volume)).size(); };
+    ASSERT_EQ(points(), 2U);
+
+    for (int round = 0; round < 2; ++round) {
+        previewAll();
+        EXPECT_EQ(previewOffset(), Day);
+        adapter().setPreviewActive(false);
+        EXPECT_EQ(points(), 2U);
+    }
+
+    host.conform();
+    for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, volume)))
+        EXPECT_LT(point->getStart(nullptr), Day - host.origin);
+    adapter().setPreviewActive(true);
+    EXPECT_EQ(previewOffset(), Day);
+}
+
+// What an edit that failed has left.
+
+TEST_P(HostPreviewStretchTest, EmptiesWhatAFailedPreviewHasLeftOnceItIsSwitchedOff)
+{
+    failInAPreview();
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), film);
+}
+
+TEST_P(HostPreviewStretchTest, EmptiesWhatAFailedRunHasLeftAndNothingElse)
+{
+    failWhile([&] { host.conform(); });
+    ASSERT_EQ(host.undoNames().back(), u"Apply Cadrel (incomplete)");
+    const Texts conformed = host.contentOf(track);
+    host.addSound(track, u"late", Day + 30.0, Day + 40.0);
+
+    previewAll();
+    adapter().setPreviewActive(false);
+
+    Texts expected = conformed;
+    std::erase_if(expected, [](const std::string& event) { return event.find(" 864") != std::string::npos; });
+    expected.emplace_back("late 86430-86440");
+    EXPECT_EQ(host.contentOf(track), expected);
+}
+
+TEST_P(HostPreviewStretchTest, KnowsWhatIsLeftAfterAnotherProjectWasActive)
+{
+    failInAPreview();
+    thrownBy([&] { failWhile([&] { adapter().setPreviewActive(false); }); });
+    host.application.activateProject(&host.application.createProject());
+    host.application.activateProject(&host.project);
+
+    previewAll();
+
+    EXPECT_EQ(previewOffset(), Day);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewStretchTest, KnowsWhatIsLeftWhenTheFailedEntryIsRedone)
+{
+    failInAPreview();
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.contentOf(track), film);
+    ASSERT_TRUE(host.redo());
+
+    host.preview(changes());
+
+    EXPECT_EQ(previewOffset(), Day);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewStretchTest, KnowsWhatIsLeftWhenALaterChangeOfTheModelIsUndone)
+{
+    failInAPreview();
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->deletes = false;
+    host.altered.replace(IEditService::iid, edits);
+    thrownBy([&] { adapter().setPreviewActive(false); });
+    host.altered.unhide(IEditService::iid);
+    adapter().createCommand(L"Load New EDL");
+    ASSERT_TRUE(host.undo());
+
+    previewAll();
+
+    EXPECT_EQ(previewOffset(), Day);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewStretchTest, KnowsWhatIsLeftWhenTheProjectIsOpenedAgain)
+{
+    failInAPreview();
+    host.model().setPreviewActive(false);
+    reopen();
+
+    previewAll();
+
+    EXPECT_EQ(previewOffset(), Day);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewStretchTest, KnowsWhatIsLeftOfAPreviewWhoseModelCannotBeRead)
+{
+    const double end = host.project.setEndTime();
+    previewAll();
+    host.project.announceStoring();
+    host.project.setAttribute(AttributeKey::StorageChecksum, FVariant::integer(1), true);
+    host.disconnect();
+    host.project.setAttribute(AttributeKey::StorageChecksum, FVariant::integer(1), true);
+    host.connect();
+    ASSERT_EQ(host.alerts->messages.size(), 1U);
+    ASSERT_FALSE(adapter().isPreviewActive());
+    EXPECT_EQ(host.project.setEndTime(), end);
+
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+
+    EXPECT_EQ(host.contentOf(track), film);
+    EXPECT_EQ(host.undoNames().back(), u"Delete Preview Range");
+}
+
+TEST_P(HostPreviewStretchTest, TakesAwayNothingForAnAttributeThatMakesNoSense)
+{
+    previewAll();
+    host.addSound(track, u"late", Day + 30.0, Day + 40.0);
+    const Texts before = host.contentOf(track);
+    const auto list = required(create<IAttributeData>(host.context()));
+    const std::string bytes = "no numbers";
+    requireOk(list->setBinary(AttributeKey::Numbers, bytes.data(), static_cast<int32>(bytes.size()), true));
+    for (const FVariant& value : {FVariant::integer(1), FVariant::string("0 1e300"), FVariant::object(list.get())}) {
+        requireOk(track->setAttribute(AttributeKey::Preview, value, true));
+
+        EXPECT_EQ(adapter().endPreview(), Result::Ok);
+
+        EXPECT_EQ(host.contentOf(track), before);
+        ASSERT_TRUE(host.undo());
+    }
+}
+
+// Memos.
+
+TEST_P(HostPreviewStretchTest, LeavesAMemoThatTheUserHasWrittenWhereTheNewCutHasNothing)
+{
+    const Node memos = host.addTrack(TypeWord::Marker, u"Memos");
+    memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
+    host.addPointMarker(memos, u"click", host.inHost(6.0));
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    host.addPointMarker(memos, u"needs sound", Day + host.inHost(4.0));
+    host.addPointMarker(memos, u"too loud", Day + host.inHost(12.0));
+    host.idle();
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"too loud 2-2", "click 6-6", "needs sound 86404-86404"}));
+}
+
+// Locks.
+
+TEST_P(HostPreviewStretchTest, LocksItsTracksAgainWhenItsEmptyingIsUndone)
+{
+    previewAll();
+    ASSERT_EQ(adapter().endPreview(), Result::Ok);
+    ASSERT_FALSE(isLocked(track));
+
+    ASSERT_TRUE(host.undo());
+    EXPECT_TRUE(isLocked(track));
+    ASSERT_TRUE(host.redo());
+    EXPECT_FALSE(isLocked(track));
+}
+
+TEST_P(HostPreviewStretchTest, LocksItsTracksAgainWhenARunIsUndoneInAHostThatKeepsNoLocks)
+{
+    for (const bool isRun : {true, false}) {
+        SCOPED_TRACE(isRun);
+        previewAll();
+        if (isRun)
+            host.conform();
+        else
+            ASSERT_EQ(adapter().endPreview(), Result::Ok);
+        ASSERT_FALSE(isLocked(track));
+        // Before it tells of the undo.
+        Texts calls;
+        const auto dependent = makeCounted<standin::tests::Recorder>(calls);
+        const auto dependencies = service<IDependencyManager>(host.context());
+        ASSERT_TRUE(host.undo());
+        query<ITrackNode>(track)->setFlag(TrackFlag::Lock, false);
+        track->setAttribute(AttributeKey::LockState, FVariant::integer(0), true);
+        adapter().getProjectModel()->notifyPreviewState();
+        host.adapter().notify(core::DataModelChangeContext(adapter().getProjectModel()));
+        ASSERT_EQ(adapter().update(host.document(), 0), ResultOk);
+
+        EXPECT_TRUE(isLocked(track));
+        adapter().setPreviewActive(false);
+    }
+}
+
+TEST_P(HostPreviewStretchTest, LocksTheTracksOfItsTimeWhenItIsRedone)
+{
+    host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
+    auto& shown = dynamic_cast<standin::Track&>(*track);
+    shown.setSelected(true);
+    const Node music = host.addTrack(TypeWord::Audio, u"Music");
+    auto& other = dynamic_cast<standin::Track&>(*music);
+    previewAll();
+    ASSERT_TRUE(isLocked(track));
+    ASSERT_FALSE(isLocked(music));
+    ASSERT_TRUE(host.undo());
+    shown.setSelected(false);
+    other.setSelected(true);
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_TRUE(isLocked(track));
+    EXPECT_FALSE(isLocked(music));
+}
+
+TEST_P(HostPreviewStretchTest, LocksATrackToThatItShowsWithNothingOnIt)
+{
+    const Node empty = host.addTrack(TypeWord::Audio, u"Spare");
+    previewAll();
+    ASSERT_TRUE(isLocked(empty));
+    ASSERT_TRUE(host.undo());
+    ASSERT_FALSE(isLocked(empty));
+
+    ASSERT_TRUE(host.redo());
+
+    EXPECT_TRUE(isLocked(empty));
+}
+
+TEST_P(HostPreviewStretchTest, LocksItsTracksWhenTheProjectWasSavedWhereTheOldPlaceWasLookedAt)
+{
+    previewAll();
+    ASSERT_EQ(adapter().cycleToEvents(changes(), 0, 0, 0), Result::Ok);
+    ASSERT_FALSE(isLocked(track));
+    reopen();
+
+    ASSERT_EQ(adapter().cycleToEvents(changes(), 0, 0, 1), Result::Ok);
+
+    EXPECT_TRUE(isLocked(track));
+}
+
+// The end of the project.
+
+TEST_P(HostPreviewStretchTest, GivesTheProjectItsOwnEndBack)
+{
+    for (const double end : {0.0, host.inHost(20.0), host.inHost(50.0), host.inHost(Day + 5.0)}) {
+        SCOPED_TRACE(end);
+        requireOk(host.document()->setProjectEnd(end));
+        previewAll();
+        ASSERT_GT(host.project.getEnd(nullptr), Day);
+
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(host.project.setEndTime(), end == host.inHost(20.0) ? 0.0 : end)
+            << "What the material reaches can't be told from no end.";
+    }
+}
+
+TEST_P(HostPreviewStretchTest, GivesTheProjectItsOwnEndBackWhereSomethingWasLeft)
+{
+    failInAPreview();
+    host.model().setPreviewActive(false);
+    reopen();
+
+    previewAll();
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), film);
+    EXPECT_EQ(host.project.getEnd(nullptr), host.inHost(20.0));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesAnEndThatTheUserSetsMeanwhile)
+{
+    for (const double end : {host.inHost(70.0), host.inHost(Day + 1000.0), host.inHost(5.0 * Day)}) {
+        SCOPED_TRACE(end);
+        requireOk(host.document()->setProjectEnd(0.0));
+        previewAll();
+        requireOk(host.document()->setProjectEnd(end));
+        host.preview(secondChange());
+
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(host.project.getEnd(nullptr), end);
+    }
+}
+
+TEST_P(HostPreviewStretchTest, LeavesAnEndThatTheUserHasSetSinceItsEndWasUndoneAndRedone)
+{
+    previewAll();
+    adapter().setPreviewActive(false);
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(host.undo());
+    const double end = host.inHost(90.0);
+    requireOk(host.document()->setProjectEnd(end));
+
+    ASSERT_TRUE(host.redo());
+    ASSERT_TRUE(host.redo());
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.project.getEnd(nullptr), end);
+}
+
+} // namespace cadrel::host::tests
