@@ -162,8 +162,10 @@ struct LawRun {
            const std::vector<std::string>& more)
         : project(folder.write("film.stage", projectText)), result(folder / "result.stage")
     {
+        // The project's attributes are invented, those of stored data too.
         std::vector<std::string> words{"apply",
                                        project,
+                                       "--fresh",
                                        "--old",
                                        folder.write("old.edl", oldText),
                                        "--new",

@@ -909,6 +909,7 @@ TEST(Shift, FilesOfOneNameOnBothSidesArePartedByTheirPaths)
     for (const std::size_t index : {1U, 3U})
         EXPECT_TRUE(tells(warned.err, "give --shift " + shifts[index] + "\n")) << warned.err;
     words.insert(words.end(), shifts.begin(), shifts.end());
+    words.push_back("--overwrite");
     const Outcome parted = runCadrel(words);
 
     EXPECT_EQ(parted.status, 0);

@@ -53,7 +53,6 @@ TEST_F(HostContextTest, OffersTheServicesThatItMakesForItselfBothWays)
 {
     EXPECT_TRUE(offers<IHostInfo>());
     EXPECT_TRUE(offers<IObjectFactory>());
-    EXPECT_TRUE(offers<IViewManager>());
 }
 
 TEST_F(HostContextTest, OffersTheServicesOfTheApplicationBothWays)
@@ -73,6 +72,7 @@ TEST_F(HostContextTest, OffersTheServicesOfTheApplicationBothWays)
     EXPECT_TRUE(offersShared(service<IMenuRegistry>(context)));
     EXPECT_TRUE(offersShared(service<IProgressService>(context)));
     EXPECT_TRUE(offersShared(service<IProjectManager>(context)));
+    EXPECT_TRUE(offersShared(service<IViewManager>(context)));
     EXPECT_TRUE(offersShared(service<ITranslationService>(context)));
     EXPECT_TRUE(offersShared(service<ITransportControl>(context)));
     EXPECT_TRUE(offersShared(service<IWindowFactoryRegistry>(context)));
