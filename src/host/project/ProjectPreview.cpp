@@ -41,7 +41,7 @@ public:
     {
         FirstFailure failure;
         for (const auto& [parent, child] : std::exchange(m_taken, {}))
-            failure.ofStep([&] { requireOk(m_transaction.insert(parent.get(), child.get())); });
+            failure.ofStep([this, &to = *parent, &event = *child] { requireOk(m_transaction.insert(&to, &event)); });
         failure.raise();
     }
 
