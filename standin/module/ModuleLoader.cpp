@@ -62,11 +62,12 @@ void ModuleLoader::load()
 
 void ModuleLoader::unload()
 {
-    m_application.views().closeAll();
-    if (m_isInitialised)
+    if (m_isInitialised) {
+        m_application.views().closeAll();
         m_controller->terminate();
-    for (const Counted<Project>& project : m_application.projects().projects())
-        project->undoList().clear();
+        for (const Counted<Project>& project : m_application.projects().projects())
+            project->undoList().clear();
+    }
     m_controller.reset();
     m_factory.reset();
     if (m_hasEntered)

@@ -93,19 +93,22 @@ int32 HostWindow::resizeView(IPlugView* view, const ViewRect& rect)
 
 void HostWindow::resizedByUser(int32 width, int32 height)
 {
+    const Counted<IPlugView> view = m_view;
     ViewRect rect{0, 0, width, height};
-    if (m_view->canResize() == 0)
-        m_view->getSize(rect);
+    if (view->canResize() == 0)
+        view->getSize(rect);
     else
-        m_view->checkSizeConstraint(rect);
+        view->checkSizeConstraint(rect);
+    if (!m_native)
+        return;
     if (widthOf(rect) != width || heightOf(rect) != height)
         m_native->setSize(widthOf(rect), heightOf(rect));
-    m_view->onSize({0, 0, widthOf(rect), heightOf(rect)});
+    view->onSize({0, 0, widthOf(rect), heightOf(rect)});
 }
 
 void HostWindow::focusChanged(bool hasFocus)
 {
-    m_view->onFocus(hasFocus);
+    Counted<IPlugView>(m_view)->onFocus(hasFocus);
 }
 
 void HostWindow::idle()

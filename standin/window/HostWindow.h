@@ -45,6 +45,7 @@ public:
     Velmark::IPlugView* view() const { return m_view.get(); }
 
 private:
+    // The view may close the window in each of its calls.
     void resizedByUser(std::int32_t width, std::int32_t height) override;
     void closedByUser() override { close(); }
     void focusChanged(bool hasFocus) override;

@@ -19,7 +19,7 @@ std::optional<WindowDescription> readWindow(const pugi::xml_node& node)
 {
     const std::string_view resizable = node.attribute("resizable").as_string("false");
     WindowDescription window{node.attribute("name").value(), node.attribute("title").value(), resizable == "true"};
-    const bool isWhole = std::string_view(node.name()) == "window" && !window.name.empty() &&
+    const bool isWhole = std::string_view(node.name()) == "window" && !node.first_child() && !window.name.empty() &&
                          isWellFormed(window.name) && isWellFormed(window.title) &&
                          (resizable == "true" || resizable == "false");
     return isWhole ? std::optional(window) : std::nullopt;

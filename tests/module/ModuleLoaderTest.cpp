@@ -3,6 +3,13 @@
 #include "standin/module/ModuleLoader.h"
 
 #include "standin/Application.h"
+#include "standin/edit/ActionManager.h"
+#include "standin/project/Project.h"
+#include "velmark/Context.h"
+#include "velmark/Editing.h"
+#include "velmark/Implements.h"
+#include "velmark/Module.h"
+#include "velmark/UserInterface.h"
 
 #include "tests/support/TempFolder.h"
 #include "tests/support/TreePaths.h"
@@ -18,6 +25,17 @@ using standin::ModuleError;
 using standin::ModuleLoader;
 
 namespace {
+
+/// A step of whoever else works on the project.
+class Step : public Velmark::Implements<Step, Velmark::FObject, Velmark::IEditStep> {
+public:
+    static constexpr const char* ClassName = "Step";
+
+    Velmark::int32 execute() override { return Velmark::ResultOk; }
+    Velmark::int32 undo() override { return Velmark::ResultOk; }
+    Velmark::int32 redo() override { return Velmark::ResultOk; }
+    const char16_t* getDescription() override { return nullptr; }
+};
 
 class ModuleLoaderTest : public testing::Test {
 protected:
@@ -75,6 +93,22 @@ TEST_F(ModuleLoaderTest, TakesBackWhatItHasDoneUpToTheStepThatFails)
 
     EXPECT_EQ(refusal(fake("RefusesHost")), fake("RefusesHost") + ": the module doesn't work in this host");
     EXPECT_EQ(calls(), "/some/resources\ninitialize\nobject released\nexit\n");
+}
+
+TEST_F(ModuleLoaderTest, LeavesTheUndoListsAloneWhenNothingWasLoaded)
+{
+    auto& project = m_application.createProject();
+    m_application.activateProject(&project);
+    const auto edits = Velmark::service<Velmark::IEditService>(m_application.context());
+    const auto transaction = Velmark::query<Velmark::IEditTransaction>(edits);
+    ASSERT_EQ(transaction->begin(true), Velmark::ResultOk);
+    ASSERT_EQ(transaction->addStep(Velmark::makeCounted<Step>().get()), Velmark::ResultOk);
+    ASSERT_EQ(transaction->commit(&project, u"Step"), Velmark::ResultOk);
+    const auto undo = [this] {
+        return m_application.actions().invoke(Velmark::IActionManager::EditCategory, Velmark::IActionManager::Undo, 0);
+    };
+    EXPECT_NE(refusal(fake("RefusesHost")), "");
+    EXPECT_EQ(undo(), Velmark::ResultOk);
 }
 
 TEST_F(ModuleLoaderTest, NamesAFileThatIsNoModule)

@@ -57,12 +57,17 @@ int32 Cadrel::initialize(FUnknown* context)
     const auto info = query<IHostInfo>(context);
     if (m_context || !hostContext || !info || !isEqual(info->getName(), HostName))
         return ResultFalse;
+    const bool hadHost = m_host != nullptr;
     const Result::Type result = resultOf([&] { registerWithHost(*hostContext); });
     if (result == Result::Ok) {
         m_context = hostContext;
         return ResultOk;
     }
     m_registration.run();
+    if (!hadHost) {
+        m_host.reset();
+        m_video.reset();
+    }
     m_layer.reset();
     return result;
 }
@@ -131,9 +136,14 @@ int32 Cadrel::openWindow()
         m_viewManager = service<IViewManager>(m_context);
     if (!m_viewManager || m_viewManager->loadSkin(bundle(), SkinFile) != ResultOk)
         return ResultFalse;
+    dropUnusedView();
+    const bool hadView = m_view != nullptr;
     Counted<IHostWindow> window;
-    if (m_viewManager->openWindow(WindowName, this, window.out()) != ResultOk || !window)
+    if (m_viewManager->openWindow(WindowName, this, window.out()) != ResultOk || !window) {
+        if (!hadView)
+            disposeView();
         return Result::HostObjectMissing;
+    }
     m_window = window.get();
     window->setCloseNotification(this);
     if (const int32 result = window->open(); result != ResultOk) {
@@ -164,14 +174,18 @@ void Cadrel::disposeView()
     m_view.reset();
 }
 
+void Cadrel::dropUnusedView()
+{
+    if (m_view && m_view->refCount() == 1)
+        disposeView();
+}
+
 int32 Cadrel::createView(const char* name, FUnknown* /*parent*/, IPlugView** view)
 {
     if (!view)
         return Result::HostObjectMissing;
     *view = nullptr;
-    // A view that the host has given back without closing its window is over.
-    if (m_view && m_view->refCount() == 1)
-        disposeView();
+    dropUnusedView();
     if (!m_context || m_view || !isEqual(name, WindowName))
         return Result::HostObjectMissing;
     return resultOf([&] {

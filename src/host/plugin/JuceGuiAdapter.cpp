@@ -64,14 +64,22 @@ JuceGuiAdapter::~JuceGuiAdapter()
     dispose();
 }
 
-void JuceGuiAdapter::dispose()
+void JuceGuiAdapter::dispose() noexcept
 {
     const juce::MessageManagerLock lock;
-    if (m_content)
-        removeChildComponent(m_content.get());
+    leaveDesktop();
+    resultOf([&] { removeChildComponent(m_content.get()); });
     m_content.reset();
-    removeFromDesktop();
     m_engine.reset();
+}
+
+void JuceGuiAdapter::leaveDesktop() noexcept
+{
+    const juce::MessageManagerLock lock;
+    m_unusedKeys.reset();
+    // What a component throws when it loses the keyboard mustn't come out of a destructor of JUCE's.
+    resultOf([&] { giveAwayKeyboardFocus(); });
+    resultOf([&] { removeFromDesktop(); });
 }
 
 int32 JuceGuiAdapter::isPlatformTypeSupported(const char* type)
@@ -85,7 +93,7 @@ int32 JuceGuiAdapter::attached(void* parent, const char* type)
         return ResultFalse;
     if (resultOf([&] { attachTo(parent); }) == util::Result::Ok)
         return CPluginView::attached(parent, type);
-    removeFromDesktop();
+    leaveDesktop();
     return ResultFalse;
 }
 
@@ -94,30 +102,43 @@ void JuceGuiAdapter::attachTo(void* parent)
     setVisible(true);
     removeFromDesktop();
     addToDesktop(0, parent);
-    if (!getPeer())
+    // Without a server JUCE makes a window that isn't anywhere.
+    if (!getPeer() || !getPeer()->getNativeHandle())
         throw util::Result::HostObjectMissing;
     setVisible(true);
+    const XConnection::Window ours = windowOf(getPeer()->getNativeHandle());
     // Until its parent first moves, JUCE takes the window to be at the corner of the screen, and opens menus there.
     if (const XConnection connection; connection.isOpen())
-        connection.tellPlace(windowOf(getPeer()->getNativeHandle()));
-    const ViewRect wanted = rectOf(getLocalBounds());
-    if (plugFrame() && (widthOf(wanted) != widthOf(rect()) || heightOf(wanted) != heightOf(rect())))
-        plugFrame()->resizeView(this, wanted);
+        connection.tellPlace(ours);
+    m_unusedKeys.emplace(ours, windowOf(parent));
+    askForSize();
+}
+
+void JuceGuiAdapter::askForSize()
+{
+    const ViewRect wanted = rectOnScreen(getLocalBounds());
+    const bool hasIt = widthOf(wanted) == widthOf(rect()) && heightOf(wanted) == heightOf(rect());
+    if (hasIt || !plugFrame() || plugFrame()->resizeView(this, wanted) != ResultOk)
+        onSize(ViewRect(rect()));
 }
 
 int32 JuceGuiAdapter::removed()
 {
     if (!systemWindow())
         return ResultOk;
-    const juce::MessageManagerLock lock;
-    if (isOnDesktop())
-        removeFromDesktop();
+    leaveDesktop();
     return CPluginView::removed();
 }
 
 int32 JuceGuiAdapter::idle()
 {
-    return resultOf([] { serve(); });
+    return resultOf([&] {
+        if (m_unusedKeys)
+            m_unusedKeys->beginServing();
+        // The view may be removed meanwhile.
+        if (serve() && m_unusedKeys)
+            m_unusedKeys->endServing();
+    });
 }
 
 int32 JuceGuiAdapter::onWheel(float distance)
@@ -128,7 +149,8 @@ int32 JuceGuiAdapter::onWheel(float distance)
     resultOf([&] {
         juce::MouseWheelDetails wheel = {};
         wheel.deltaY = distance;
-        const auto place = peer->globalToLocal(juce::Desktop::getMousePosition().toFloat());
+        const auto place =
+            peer->globalToLocal(juce::Desktop::getInstance().getMainMouseSource().getRawScreenPosition());
         peer->handleMouseWheel(juce::MouseInputSource::InputSourceType::mouse, place, juce::Time::currentTimeMillis(),
                                wheel);
     });
@@ -169,25 +191,22 @@ int32 JuceGuiAdapter::onSize(const ViewRect& rect)
 int32 JuceGuiAdapter::onFocus(bool state)
 {
     return resultOf([&] {
-        // A host may say so again while a field of the content has it.
-        if (state && m_content && isShowing() && !hasKeyboardFocus(true))
+        if (!state || !m_content || !isShowing())
+            return;
+        // A host may say so again while a field of the content has it, and before JUCE hears that it has lost it.
+        if (!hasKeyboardFocus(true))
             m_content->grabKeyboardFocus();
+        else if (!getPeer()->isFocused())
+            getPeer()->grabFocus();
     });
 }
 
 int32 JuceGuiAdapter::checkSizeConstraint(ViewRect& rect)
 {
     return resultOf([&] {
-        const ViewRect least = rectOf({MinimumWidth, MinimumHeight});
-        int32 width = widthOf(least);
-        int32 height = heightOf(least);
-        if (const auto* const display = juce::Desktop::getInstance().getDisplays().getPrimaryDisplay()) {
-            const ViewRect screen = rectOf(display->userArea);
-            width = std::min(width, widthOf(screen));
-            height = std::min(height, heightOf(screen));
-        }
-        rect.right = std::max(rect.right, rect.left + width);
-        rect.bottom = std::max(rect.bottom, rect.top + height);
+        const ViewRect least = rectOnScreen({MinimumWidth, MinimumHeight});
+        rect.right = std::max(rect.right, rect.left + widthOf(least));
+        rect.bottom = std::max(rect.bottom, rect.top + heightOf(least));
     });
 }
 
@@ -200,6 +219,15 @@ ViewRect JuceGuiAdapter::rectOf(juce::Rectangle<int> size) const
 {
     const auto toHosts = [](int pixels) { return static_cast<int32>(std::lround(pixels * scale())); };
     return {rect().left, rect().top, rect().left + toHosts(size.getWidth()), rect().top + toHosts(size.getHeight())};
+}
+
+ViewRect JuceGuiAdapter::rectOnScreen(juce::Rectangle<int> size) const
+{
+    if (const auto* const display = juce::Desktop::getInstance().getDisplays().getPrimaryDisplay()) {
+        const auto& area = display->userArea;
+        size = size.withSize(std::min(size.getWidth(), area.getWidth()), std::min(size.getHeight(), area.getHeight()));
+    }
+    return rectOf(size);
 }
 
 void JuceGuiAdapter::resized()
@@ -238,8 +266,9 @@ bool JuceGuiAdapter::keyPressed(const juce::KeyPress& key)
         return invokeEditAction(IActionManager::Undo);
     if (isEditKey(key, 'z', true))
         return invokeEditAction(IActionManager::Redo);
-    if (!m_keyIsFromHost)
-        sendToParent(key);
+    // Tab moves the keyboard after this. What the host has handed over it has got.
+    if (!key.isKeyCode(juce::KeyPress::tabKey) && !m_keyIsFromHost && m_unusedKeys)
+        m_unusedKeys->sendOn(key.getKeyCode(), key.getTextCharacter());
     return false;
 }
 
@@ -247,14 +276,6 @@ bool JuceGuiAdapter::invokeEditAction(const char* action)
 {
     const auto actions = service<IActionManager>(m_context);
     return actions && actions->invoke(IActionManager::EditCategory, action, 0) == ResultOk;
-}
-
-void JuceGuiAdapter::sendToParent(const juce::KeyPress& key)
-{
-    if (!systemWindow())
-        return;
-    if (const XConnection connection; connection.isOpen())
-        connection.sendKey(windowOf(systemWindow()), toXKey(key));
 }
 
 } // namespace cadrel::host

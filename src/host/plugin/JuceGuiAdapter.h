@@ -3,12 +3,14 @@
 #pragma once
 
 #include "host/plugin/JuceLayer.h"
+#include "host/plugin/UnusedKeys.h"
 #include "velmark/CPluginView.h"
 #include "velmark/FObject.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
 #include <memory>
+#include <optional>
 
 namespace Velmark {
 class IHostContext;
@@ -37,7 +39,7 @@ public:
     ~JuceGuiAdapter() override;
 
     /// Takes the content away for good, with its window; what the host calls afterwards does nothing.
-    void dispose();
+    void dispose() noexcept;
 
     /// Takes a parent of the kind ParentType::X11Window, one at a time.
     Velmark::int32 attached(void* parent, const char* type) override;
@@ -57,20 +59,25 @@ public:
 
     void resized() override;
     void childBoundsChanged(juce::Component* child) override;
-    /// What no component has used: undo and redo are the host's actions, and the rest goes on to the host's window.
+    /// What no component has used: undo and redo are the host's actions, Tab moves the keyboard, and the rest goes on to the
+    /// host's window.
     bool keyPressed(const juce::KeyPress& key) override;
 
 private:
     static double scale();
     Velmark::ViewRect rectOf(juce::Rectangle<int> size) const;
+    /// The same, but not larger than the screen.
+    Velmark::ViewRect rectOnScreen(juce::Rectangle<int> size) const;
     void attachTo(void* parent);
+    void askForSize();
+    void leaveDesktop() noexcept;
     void layOutContent();
     bool invokeEditAction(const char* action);
-    void sendToParent(const juce::KeyPress& key);
 
     std::unique_ptr<juce::Component> m_content; ///< null after its end
     Velmark::IHostContext* m_context;
     Velmark::Counted<Velmark::FObject> m_engine;
+    std::optional<UnusedKeys> m_unusedKeys; ///< while it is attached
     bool m_isLayingOut = false;
     bool m_keyIsFromHost = false; ///< so it needn't be sent back
 };

@@ -45,15 +45,16 @@ JuceLayer::~JuceLayer()
         layer.reset();
 }
 
-void JuceLayer::serve()
+bool JuceLayer::serve()
 {
     if (isServing || users == 0)
-        return;
+        return false;
     const juce::ScopedValueSetter<bool> serving(isServing, true);
     // A component may end the layer in its call, with all descriptors.
     const JuceLayer held;
     for (const int descriptor : juce::LinuxEventLoopInternal::getRegisteredFds())
         juce::LinuxEventLoopInternal::invokeEventLoopCallbackForFd(descriptor);
+    return true;
 }
 
 double JuceLayer::screenScale()

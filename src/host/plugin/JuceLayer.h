@@ -13,9 +13,10 @@ public:
     JuceLayer& operator=(const JuceLayer&) = delete;
     ~JuceLayer();
 
-    /// Lets JUCE deal with what has come since the last call: events of its windows, timers, messages. A call from within
-    /// another does nothing. Throws what the components throw; what is left is dealt with at the next call.
-    static void serve();
+    /// Lets JUCE deal with what has come: each descriptor that JUCE listens to is served once, which deals with all events of
+    /// its windows that are there, the timers that are due and one message. False for a call from within another, which does
+    /// nothing. Throws what the components throw; what is left is dealt with at the next call.
+    static bool serve();
 
     /// Physical pixels for each of JUCE's, as the user has set them for all programs: "Xft.dpi" of the X server's resources
     /// by 96, in steps of a quarter, and 1 to 4.

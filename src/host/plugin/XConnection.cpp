@@ -7,19 +7,22 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdlib>
+#include <mutex>
 #include <vector>
 
 namespace cadrel::host {
 
 namespace {
 
-/// Those that are open; of the main thread.
+/// Those that are open. An X error may come on another thread of the host.
+std::mutex openMutex;
 std::vector<::Display*> open;
 
 } // namespace
 
 XConnection::XConnection() : m_display(XOpenDisplay(nullptr))
 {
+    const std::scoped_lock lock(openMutex);
     if (m_display)
         open.push_back(m_display);
 }
@@ -29,11 +32,13 @@ XConnection::~XConnection()
     if (!m_display)
         return;
     XCloseDisplay(m_display);
+    const std::scoped_lock lock(openMutex);
     std::erase(open, m_display);
 }
 
 bool XConnection::isOurs(Display* display)
 {
+    const std::scoped_lock lock(openMutex);
     return std::find(open.begin(), open.end(), display) != open.end();
 }
 
@@ -70,27 +75,6 @@ void XConnection::tellPlace(Window window) const
     event.xconfigure.width = attributes.width;
     event.xconfigure.height = attributes.height;
     XSendEvent(m_display, window, False, StructureNotifyMask, &event);
-}
-
-bool XConnection::sendKey(Window window, const XKey& key) const
-{
-    const KeyCode code = XKeysymToKeycode(m_display, key.symbol);
-    if (code == 0)
-        return false;
-    XEvent event = {};
-    event.xkey.display = m_display;
-    event.xkey.window = window;
-    event.xkey.root = DefaultRootWindow(m_display);
-    event.xkey.time = CurrentTime;
-    event.xkey.same_screen = True;
-    event.xkey.keycode = code;
-    event.xkey.state = (key.withShift ? unsigned{ShiftMask} : 0U) | (key.withControl ? unsigned{ControlMask} : 0U) |
-                       (key.withAlt ? unsigned{Mod1Mask} : 0U);
-    event.type = KeyPress;
-    XSendEvent(m_display, window, True, KeyPressMask, &event);
-    event.type = KeyRelease;
-    XSendEvent(m_display, window, True, KeyReleaseMask, &event);
-    return true;
 }
 
 } // namespace cadrel::host

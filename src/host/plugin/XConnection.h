@@ -6,14 +6,6 @@ struct _XDisplay;
 
 namespace cadrel::host {
 
-/// A key of the X server, by its keysym, and the modifiers held.
-struct XKey {
-    unsigned long symbol;
-    bool withShift;
-    bool withControl;
-    bool withAlt;
-};
-
 /// A connection of our own to the X server, for what JUCE doesn't do. This header names nothing of Xlib's, whose macros and
 /// JUCE's names don't go together.
 class XConnection {
@@ -31,6 +23,8 @@ public:
     static bool isOurs(Display* display);
 
     bool isOpen() const { return m_display != nullptr; }
+    /// Null while it isn't open.
+    Display* display() const { return m_display; }
 
     /// Makes the names known to the server that JUCE looks up.
     void introduceNames() const;
@@ -38,8 +32,6 @@ public:
     double screenScale() const;
     /// Tells a window of ours to look at its place on the screen again.
     void tellPlace(Window window) const;
-    /// Sends a key to a window, as if it had been pressed and released there. False for one that the keyboard hasn't got.
-    bool sendKey(Window window, const XKey& key) const;
 
 private:
     Display* m_display;

@@ -38,9 +38,11 @@ int handleError(Display* display, XErrorEvent* error)
 
 XErrors::XErrors()
 {
-    if (isInstalled)
-        return;
-    previousHandler = XSetErrorHandler(handleError);
+    const XErrorHandler current = XSetErrorHandler(handleError);
+    if (current == handleError || isInstalled)
+        XSetErrorHandler(current);
+    else
+        previousHandler = current;
     isInstalled = true;
 }
 

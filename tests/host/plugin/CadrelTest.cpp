@@ -5,6 +5,7 @@
 #include "standin/Application.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/module/ModuleLoader.h"
+#include "standin/project/Project.h"
 #include "standin/services/MenuRegistry.h"
 #include "standin/services/Translations.h"
 #include "standin/services/WindowFactoryRegistry.h"
@@ -14,6 +15,7 @@
 #include "velmark/ModuleState.h"
 #include "velmark/Project.h"
 
+#include "tests/support/TempFolder.h"
 #include "tests/support/TreePaths.h"
 #include "tests/support/x11/VirtualScreen.h"
 #include "tests/support/x11/XWindows.h"
@@ -77,18 +79,37 @@ public:
     const char* name = "Studio";
 };
 
-class RefusingFactories : public Implements<RefusingFactories, FObject, IWindowFactoryRegistry> {
+/// Menus, actions and window factories of a host that refuses one of them, and counts what is taken back.
+class Registries : public Implements<Registries, FObject, IMenuRegistry, IActionManager, IWindowFactoryRegistry> {
 public:
-    static constexpr const char* ClassName = "RefusingFactories";
+    static constexpr const char* ClassName = "Registries";
 
-    int32 addFactory(IPlugWindowFactory*) override { return ResultFalse; }
-    int32 removeFactory(IPlugWindowFactory*) override
+    enum class Step { Command, Handler, Factory };
+
+    explicit Registries(Step refused) : m_refused(refused) {}
+
+    int32 addCommand(BundleHandle, const char*, const char16_t*, int32, const char*, const char*) override
     {
-        ++removals;
-        return ResultFalse;
+        return answer(Step::Command);
+    }
+    int32 removeCommands(BundleHandle) override { return note("command"); }
+    int32 addHandler(IActionHandler*) override { return answer(Step::Handler); }
+    int32 removeHandler(IActionHandler*) override { return note("handler"); }
+    int32 invoke(const char*, const char*, int32) override { return ResultFalse; }
+    int32 addFactory(IPlugWindowFactory*) override { return answer(Step::Factory); }
+    int32 removeFactory(IPlugWindowFactory*) override { return note("factory"); }
+
+    std::vector<std::string> removed;
+
+private:
+    int32 answer(Step step) const { return step == m_refused ? ResultFalse : ResultOk; }
+    int32 note(const char* what)
+    {
+        removed.push_back(what);
+        return ResultOk;
     }
 
-    int removals = 0;
+    Step m_refused;
 };
 
 /// Opens windows that can't come on the screen.
@@ -117,11 +138,14 @@ public:
     {
         window = makeCounted<Window>();
         builder->createView(name, nullptr, window->view.out());
+        if (failsAfterTheView)
+            return ResultFalse;
         *out = Counted<Window>(window).detach();
         return ResultOk;
     }
 
     Counted<Window> window;
+    bool failsAfterTheView = false;
 };
 
 class CadrelTest : public testing::Test {
@@ -193,18 +217,59 @@ TEST_F(CadrelTest, WorksInNoHostWithoutAName)
     EXPECT_FALSE(isRegistered());
 }
 
-TEST_F(CadrelTest, TakesEverythingBackWhenAStepFails)
+TEST_F(CadrelTest, TakesEachStepBackOnceWhenALaterOneFails)
 {
-    const auto factories = makeCounted<RefusingFactories>();
-    m_context->replace<IWindowFactoryRegistry>(factories.get());
+    using Step = Registries::Step;
+    const std::vector<std::pair<Step, std::vector<std::string>>> expected = {
+        {Step::Command, {}},
+        {Step::Handler, {"command"}},
+        {Step::Factory, {"handler", "command"}},
+    };
+    for (const auto& [refused, removed] : expected) {
+        const auto registries = makeCounted<Registries>(refused);
+        const auto context = makeCounted<OtherContext>(m_application.context());
+        context->replace<IMenuRegistry>(registries.get());
+        context->replace<IActionManager>(registries.get());
+        context->replace<IWindowFactoryRegistry>(registries.get());
 
-    EXPECT_NE(initialize(), ResultOk);
-    EXPECT_FALSE(isRegistered());
-    EXPECT_EQ(factories->removals, 0);
-    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
-
+        EXPECT_NE(m_cadrel->initialize(static_cast<IHostContext*>(context.get())), ResultOk);
+        EXPECT_EQ(registries->removed, removed);
+        EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+        EXPECT_EQ(registries->removed, removed);
+    }
     EXPECT_EQ(m_cadrel->initialize(m_application.context()), ResultOk);
     EXPECT_TRUE(isRegistered());
+}
+
+TEST_F(CadrelTest, WritesNothingIntoProjectsOfAHostThatItDoesNotWorkIn)
+{
+    const cadrel::tests::TempFolder folder;
+    auto& project = m_application.createProject();
+    m_application.activateProject(&project);
+    const auto registries = makeCounted<Registries>(Registries::Step::Factory);
+    m_context->replace<IWindowFactoryRegistry>(registries.get());
+    ASSERT_NE(initialize(), ResultOk);
+
+    m_application.saveProject(project, folder.path() / "Film.stagio");
+    EXPECT_NE(project.hasAttribute("CaDr"), ResultOk);
+
+    ASSERT_EQ(m_cadrel->initialize(m_application.context()), ResultOk);
+    m_application.saveProject(project, folder.path() / "Film.stagio");
+    EXPECT_EQ(project.hasAttribute("CaDr"), ResultOk);
+}
+
+TEST_F(CadrelTest, KeepsWhatItHasOfProjectsWhenALaterInitialisationFails)
+{
+    const cadrel::tests::TempFolder folder;
+    auto& project = m_application.createProject();
+    m_cadrel->initialize(m_application.context());
+    m_cadrel->terminate();
+    const auto registries = makeCounted<Registries>(Registries::Step::Factory);
+    m_context->replace<IWindowFactoryRegistry>(registries.get());
+    ASSERT_NE(initialize(), ResultOk);
+
+    m_application.saveProject(project, folder.path() / "Film.stagio");
+    EXPECT_EQ(project.hasAttribute("CaDr"), ResultOk);
 }
 
 TEST_F(CadrelTest, NeedsTheProjectsOfTheHost)
@@ -269,6 +334,20 @@ TEST_F(CadrelTest, ForgetsAWindowThatDoesNotOpen)
     EXPECT_EQ(views->window->listener, nullptr);
     EXPECT_FALSE(m_cadrel->hasWindow(views->window.get()));
     EXPECT_EQ(m_cadrel->windowClosed(views->window.get()), ResultOk);
+}
+
+TEST_F(CadrelTest, EndsAViewThatTheHostHasFoundNoWindowFor)
+{
+    const auto views = makeCounted<BrokenViews>();
+    views->failsAfterTheView = true;
+    m_context->replace<IViewManager>(views.get());
+    initialize();
+    ASSERT_NE(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
+    ASSERT_TRUE(views->window->view);
+
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
+    Counted<IPlugView> next;
+    EXPECT_EQ(m_cadrel->createView("CadrelWindow", nullptr, next.out()), ResultOk);
 }
 
 TEST_F(CadrelTest, TitlesItsCommandInTheLanguageThatTheHostKnowsBefore)

@@ -42,11 +42,26 @@ public:
         setOpaque(true);
         setWantsKeyboardFocus(true);
         addAndMakeVisible(field);
+        addAndMakeVisible(second);
     }
     ~Content() override { m_calls.push_back("gone"); }
 
     void paint(juce::Graphics& graphics) override { graphics.fillAll(juce::Colour(0xff336699)); }
-    void resized() override { field.setBounds(10, 10, 200, 24); }
+    void resized() override
+    {
+        field.setBounds(10, 10, 200, 24);
+        second.setBounds(10, 40, 200, 24);
+    }
+    void focusLost(FocusChangeType) override
+    {
+        if (throwsAtFocusLost)
+            throw std::runtime_error("focus");
+    }
+    void parentHierarchyChanged() override
+    {
+        if (throwsWhenAttached)
+            throw std::runtime_error("parent");
+    }
     void mouseDown(const juce::MouseEvent& event) override
     {
         place = event.getPosition();
@@ -55,8 +70,9 @@ public:
         if (throws)
             throw std::runtime_error("mouse");
     }
-    void mouseWheelMove(const juce::MouseEvent&, const juce::MouseWheelDetails& wheel) override
+    void mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel) override
     {
+        place = event.getPosition();
         m_calls.push_back(wheel.deltaY > 0 ? "wheel up" : "wheel down");
     }
     bool keyPressed(const juce::KeyPress& key) override
@@ -66,8 +82,11 @@ public:
     }
 
     juce::TextEditor field;
+    juce::TextEditor second;
     juce::Point<int> place;
     bool throws = false;
+    bool throwsAtFocusLost = false;
+    bool throwsWhenAttached = false;
 
 private:
     std::vector<std::string>& m_calls;
@@ -104,7 +123,7 @@ protected:
     {
         m_screen = std::make_unique<VirtualScreen>(width, height);
         if (dpi != 0)
-            m_screen->setDpi(dpi);
+            m_screen->setDpi(std::to_string(dpi));
         m_windows = std::make_unique<XWindows>();
         m_user = std::make_unique<XUser>();
         m_layer.emplace();
@@ -115,13 +134,24 @@ protected:
         m_content = content.get();
         m_view = makeCounted<JuceGuiAdapter>(std::move(content), m_actions.get(), nullptr);
     }
-    void open()
+    void open(bool isResizable = true)
     {
         const auto ignore = [](standin::HostWindow&, bool) {};
-        m_window = makeCounted<standin::HostWindow>(*m_windows, standin::WindowDescription{"Window", "Test", true},
-                                                    Counted<IPlugView>(m_view), ignore);
+        m_window = makeCounted<standin::HostWindow>(
+            *m_windows, standin::WindowDescription{"Window", "Test", isResizable}, Counted<IPlugView>(m_view), ignore);
         ASSERT_EQ(m_window->open(), ResultOk);
         ASSERT_TRUE(turnUntil([this] { return m_content->isShowing() && m_windows->colourAt(500, 400) == 0x336699; }));
+    }
+    /// A window of the host without a frame.
+    std::unique_ptr<standin::NativeWindow> makeNative()
+    {
+        struct Listener : standin::NativeWindow::Listener {
+            void resizedByUser(std::int32_t, std::int32_t) override {}
+            void closedByUser() override {}
+            void focusChanged(bool) override {}
+        };
+        static Listener listener;
+        return m_windows->createWindow("Test", 1300, 750, listener);
     }
     void start()
     {
@@ -175,6 +205,21 @@ protected:
 
 } // namespace
 
+TEST(JuceLayerScale, IsInQuartersFromOneToFourWhateverTheUserHasWritten)
+{
+    VirtualScreen screen;
+    EXPECT_EQ(JuceLayer::screenScale(), 1.0);
+    const std::vector<std::pair<std::string, double>> expected = {
+        {"96", 1.0},   {"95", 1.0},   {"24", 1.0},  {"0", 1.0},    {"-192", 1.0}, {"107", 1.0},  {"108", 1.25},
+        {"120", 1.25}, {"144", 1.5},  {"192", 2.0}, {"371", 3.75}, {"372", 4.0},  {"384", 4.0},  {"385", 4.0},
+        {"9600", 4.0}, {"fine", 1.0}, {"", 1.0},    {"nan", 1.0},  {"inf", 1.0},  {"-inf", 1.0}, {"1e999", 1.0},
+    };
+    for (const auto& [dpi, scale] : expected) {
+        screen.setDpi(dpi);
+        EXPECT_EQ(JuceLayer::screenScale(), scale) << dpi;
+    }
+}
+
 TEST_F(JuceGuiAdapterTest, HasItsSizeBeforeItIsAttached)
 {
     startServer();
@@ -190,15 +235,7 @@ TEST_F(JuceGuiAdapterTest, IsAttachedToOneWindowOfTheXServerAlone)
 {
     startServer();
     makeView();
-    const auto native = [this] {
-        struct Listener : standin::NativeWindow::Listener {
-            void resizedByUser(std::int32_t, std::int32_t) override {}
-            void closedByUser() override {}
-            void focusChanged(bool) override {}
-        };
-        static Listener listener;
-        return m_windows->createWindow("Test", 1300, 750, listener);
-    }();
+    const auto native = makeNative();
 
     EXPECT_EQ(m_view->isPlatformTypeSupported("X11Window"), ResultOk);
     EXPECT_NE(m_view->isPlatformTypeSupported("Other"), ResultOk);
@@ -256,6 +293,58 @@ TEST_F(JuceGuiAdapterTest, LeavesTheKeysToTheHostThatItDoesNotUse)
     EXPECT_EQ(m_windows->keys(), (std::vector<unsigned long>{XK_space, XK_F5}));
 }
 
+TEST_F(JuceGuiAdapterTest, SendsAKeyOnAsTheUserHasPressedIt)
+{
+    start();
+    clickContent();
+
+    m_user->press(XK_KP_Add);
+    m_user->press('a');
+    m_user->press(XK_equal, XK_Shift_L);
+    m_user->press(XK_KP_Subtract);
+    m_user->press(XK_KP_Home);
+    m_user->press(XK_KP_Enter);
+    m_user->press('b', XK_Control_L);
+    EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() >= 12; }));
+    for (int count = 0; count < 5; ++count)
+        turn();
+    EXPECT_EQ(m_windows->keyEvents(),
+              (std::vector<std::string>{"press KP_Add", "release KP_Add", "press plus", "release plus",
+                                        "press KP_Subtract", "release KP_Subtract", "press KP_Home", "release KP_Home",
+                                        "press KP_Enter", "release KP_Enter", "press b", "release b"}));
+}
+
+TEST_F(JuceGuiAdapterTest, SendsTheReleaseOfAKeyOnWhenItComes)
+{
+    start();
+    clickContent();
+
+    m_user->hold(XK_F5);
+    EXPECT_TRUE(turnUntil([this] { return !m_windows->keyEvents().empty(); }));
+    for (int count = 0; count < 5; ++count)
+        turn();
+    EXPECT_EQ(m_windows->keyEvents(), std::vector<std::string>{"press F5"});
+    m_user->release(XK_F5);
+    EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() > 1; }));
+    EXPECT_EQ(m_windows->keyEvents(), (std::vector<std::string>{"press F5", "release F5"}));
+}
+
+TEST_F(JuceGuiAdapterTest, KeepsTabWhichMovesTheKeyboardFromFieldToField)
+{
+    start();
+    m_user->moveTo(100, 52);
+    m_user->click();
+    ASSERT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
+
+    m_user->press(XK_Tab);
+    EXPECT_TRUE(turnUntil([this] { return m_content->second.hasKeyboardFocus(true); }));
+    m_user->press(XK_Tab, XK_Shift_L);
+    EXPECT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
+    for (int count = 0; count < 5; ++count)
+        turn();
+    EXPECT_EQ(m_windows->keyEvents(), std::vector<std::string>());
+}
+
 TEST_F(JuceGuiAdapterTest, KeepsTheKeysThatATextFieldUses)
 {
     start();
@@ -304,12 +393,40 @@ TEST_F(JuceGuiAdapterTest, AnswersWhetherItHasUsedAKeyOfTheHost)
     EXPECT_TRUE(m_windows->keys().empty());
 }
 
+TEST_F(JuceGuiAdapterTest, TakesKeysOfTheHostWithControlHeld)
+{
+    start();
+    clickContent();
+
+    EXPECT_EQ(m_view->onKeyDown(u'z', 0, KeyModifier::Control), 1);
+    EXPECT_EQ(m_view->onKeyDown(u'Z', 0, KeyModifier::Control | KeyModifier::Shift), 1);
+    EXPECT_EQ(m_actions->invoked, (std::vector<std::string>{"Edit/Undo", "Edit/Redo"}));
+    EXPECT_EQ(m_view->onKeyDown(u'z', 0, KeyModifier::Control | KeyModifier::Alt), 0);
+    EXPECT_EQ(m_view->onKeyDown(u'b', 0, KeyModifier::Control), 0);
+    EXPECT_TRUE(has("key ctrl + B"));
+    EXPECT_EQ(m_actions->invoked.size(), 2U);
+}
+
 TEST_F(JuceGuiAdapterTest, TakesTheKeyboardWhenTheHostSaysSo)
 {
     start();
     EXPECT_EQ(m_view->onFocus(true), ResultOk);
     EXPECT_TRUE(turnUntil([this] { return m_content->hasKeyboardFocus(false); }));
 
+    m_user->press('a');
+    EXPECT_TRUE(turnUntil([this] { return has("key A"); }));
+}
+
+TEST_F(JuceGuiAdapterTest, TakesTheKeyboardBackThatItHasLostSinceItLastLooked)
+{
+    start();
+    clickContent();
+    const unsigned long ours = m_user->focus();
+    m_user->setFocus(reinterpret_cast<std::uintptr_t>(m_window->native()->parent()));
+    ASSERT_NE(m_user->focus(), ours);
+
+    EXPECT_EQ(m_view->onFocus(true), ResultOk);
+    EXPECT_TRUE(turnUntil([&] { return m_user->focus() == ours && m_content->hasKeyboardFocus(false); }));
     m_user->press('a');
     EXPECT_TRUE(turnUntil([this] { return has("key A"); }));
 }
@@ -355,10 +472,7 @@ TEST_F(JuceGuiAdapterTest, PutsTheSizeBackThatTheHostRefuses)
 {
     startServer();
     makeView();
-    const auto ignore = [](standin::HostWindow&, bool) {};
-    m_window = makeCounted<standin::HostWindow>(*m_windows, standin::WindowDescription{"Window", "Test", false},
-                                                Counted<IPlugView>(m_view), ignore);
-    ASSERT_EQ(m_window->open(), ResultOk);
+    open(false);
 
     m_content->setSize(1400, 800);
 
@@ -377,18 +491,37 @@ TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerInASmallerWindow)
     EXPECT_EQ(m_view->getLocalArea(m_content, m_content->getLocalBounds()), juce::Rectangle<int>(0, 0, 650, 750));
 }
 
-TEST_F(JuceGuiAdapterTest, HoldsToItsLeastSizeOrToTheScreens)
+TEST_F(JuceGuiAdapterTest, HoldsToItsLeastSize)
 {
     startServer();
     makeView();
-    ViewRect rect{0, 0, 1299, 749};
-    EXPECT_EQ(m_view->checkSizeConstraint(rect), ResultOk);
-    EXPECT_EQ(rect.right, 1300);
-    EXPECT_EQ(rect.bottom, 750);
-    rect = {5, 6, 1405, 906};
-    m_view->checkSizeConstraint(rect);
-    EXPECT_EQ(rect.right, 1405);
-    EXPECT_EQ(rect.bottom, 906);
+    const auto constrained = [this](int32 width, int32 height) {
+        ViewRect rect{5, 6, 5 + width, 6 + height};
+        EXPECT_EQ(m_view->checkSizeConstraint(rect), ResultOk);
+        EXPECT_EQ(rect.left, 5);
+        EXPECT_EQ(rect.top, 6);
+        return std::pair(rect.right - 5, rect.bottom - 6);
+    };
+    EXPECT_EQ(constrained(1299, 749), std::pair(1300, 750));
+    EXPECT_EQ(constrained(1300, 750), std::pair(1300, 750));
+    EXPECT_EQ(constrained(1301, 751), std::pair(1301, 751));
+    EXPECT_EQ(constrained(1299, 751), std::pair(1300, 751));
+    EXPECT_EQ(constrained(0, 0), std::pair(1300, 750));
+    EXPECT_EQ(constrained(-1, -1), std::pair(1300, 750));
+}
+
+TEST_F(JuceGuiAdapterTest, HoldsToItsLeastSizeOnAFineScreen)
+{
+    startServer(3200, 2000, 192);
+    makeView();
+    const auto constrained = [this](int32 width, int32 height) {
+        ViewRect rect{0, 0, width, height};
+        EXPECT_EQ(m_view->checkSizeConstraint(rect), ResultOk);
+        return std::pair(rect.right, rect.bottom);
+    };
+    EXPECT_EQ(constrained(2599, 1499), std::pair(2600, 1500));
+    EXPECT_EQ(constrained(2600, 1500), std::pair(2600, 1500));
+    EXPECT_EQ(constrained(2601, 1501), std::pair(2601, 1501));
 }
 
 TEST_F(JuceGuiAdapterTest, TakesASmallScreenForTheLeastSize)
@@ -419,6 +552,57 @@ TEST_F(JuceGuiAdapterTest, AsksForPhysicalPixelsOnAFineScreen)
     m_user->click();
     EXPECT_TRUE(turnUntil([this] { return has("mouse"); }));
     EXPECT_EQ(m_content->place, juce::Point<int>(500, 400));
+
+    m_content->place = {};
+    m_view->onWheel(1.0F);
+    EXPECT_TRUE(has("wheel up"));
+    EXPECT_EQ(m_content->place, juce::Point<int>(500, 400));
+}
+
+TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerWhereTheHostGivesNoMorePixels)
+{
+    startServer(3200, 2000, 192);
+    makeView();
+    open(false);
+
+    EXPECT_EQ(size().right, 1300);
+    EXPECT_EQ(size().bottom, 750);
+    EXPECT_EQ(m_view->getLocalBounds(), juce::Rectangle<int>(0, 0, 650, 375));
+    EXPECT_EQ(m_content->getLocalBounds(), juce::Rectangle<int>(0, 0, 1300, 750));
+    EXPECT_EQ(m_view->getLocalArea(m_content, m_content->getLocalBounds()), juce::Rectangle<int>(0, 0, 650, 375));
+}
+
+TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerOnAFineScreenWithoutAFrame)
+{
+    startServer(3200, 2000, 192);
+    makeView();
+    const auto native = makeNative();
+
+    ASSERT_EQ(m_view->attached(native->parent(), "X11Window"), ResultOk);
+    EXPECT_EQ(m_view->getLocalBounds(), juce::Rectangle<int>(0, 0, 650, 375));
+    EXPECT_EQ(m_content->getLocalBounds(), juce::Rectangle<int>(0, 0, 1300, 750));
+    m_view->removed();
+}
+
+TEST_F(JuceGuiAdapterTest, AsksForNoMoreThanAFineScreenHas)
+{
+    startServer(1920, 1080, 192);
+    makeView();
+    open();
+
+    EXPECT_EQ(size().right, 1920);
+    EXPECT_EQ(size().bottom, 1080);
+    EXPECT_EQ(m_view->getLocalBounds(), juce::Rectangle<int>(0, 0, 960, 540));
+}
+
+TEST_F(JuceGuiAdapterTest, AsksForNoMoreThanASmallScreenHas)
+{
+    startServer(1024, 600);
+    makeView();
+    open();
+
+    EXPECT_EQ(size().right, 1024);
+    EXPECT_EQ(size().bottom, 600);
 }
 
 TEST_F(JuceGuiAdapterTest, LetsNoExceptionOfTheContentReachTheHost)
@@ -433,6 +617,65 @@ TEST_F(JuceGuiAdapterTest, LetsNoExceptionOfTheContentReachTheHost)
     m_calls.clear();
     m_user->click();
     EXPECT_TRUE(turnUntil([this] { return has("mouse"); }));
+}
+
+TEST_F(JuceGuiAdapterTest, LetsNoExceptionOutWhenItIsClosed)
+{
+    start();
+    clickContent();
+    m_content->throwsAtFocusLost = true;
+
+    EXPECT_EQ(m_view->removed(), ResultOk);
+    EXPECT_FALSE(m_view->isOnDesktop());
+    EXPECT_FALSE(m_content->hasKeyboardFocus(true));
+}
+
+TEST_F(JuceGuiAdapterTest, LetsNoExceptionOutWhenItIsDisposedOf)
+{
+    start();
+    clickContent();
+    m_content->throwsAtFocusLost = true;
+
+    m_view->dispose();
+    EXPECT_TRUE(has("gone"));
+    EXPECT_FALSE(m_view->isOnDesktop());
+}
+
+TEST_F(JuceGuiAdapterTest, LetsNoExceptionOutWhenItIsAttached)
+{
+    startServer();
+    makeView();
+    const auto native = makeNative();
+    m_content->throwsWhenAttached = true;
+    EXPECT_NE(m_view->attached(native->parent(), "X11Window"), ResultOk);
+    EXPECT_FALSE(m_view->isOnDesktop());
+
+    m_content->throwsWhenAttached = false;
+    EXPECT_EQ(m_view->attached(native->parent(), "X11Window"), ResultOk);
+    m_view->removed();
+}
+
+TEST_F(JuceGuiAdapterTest, IsAttachedToNothingWithoutAServer)
+{
+    m_layer.emplace();
+    makeView();
+
+    EXPECT_NE(m_view->attached(this, "X11Window"), ResultOk);
+    EXPECT_FALSE(m_view->isOnDesktop());
+}
+
+TEST_F(JuceGuiAdapterTest, LetsTheContentHaveItsSizeWhereThereIsNobodyToAsk)
+{
+    startServer();
+    makeView();
+    const auto native = makeNative();
+    ASSERT_EQ(m_view->attached(native->parent(), "X11Window"), ResultOk);
+
+    m_content->setSize(1400, 800);
+    EXPECT_EQ(m_content->getWidth(), 1400);
+    EXPECT_EQ(size().right, 1300);
+    EXPECT_EQ(m_view->getWidth(), 1300);
+    m_view->removed();
 }
 
 TEST_F(JuceGuiAdapterTest, EndsItsContentWhenItIsDisposedOf)

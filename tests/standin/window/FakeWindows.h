@@ -6,8 +6,10 @@
 #include "velmark/CPluginView.h"
 #include "velmark/Module.h"
 
+#include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::tests {
@@ -79,11 +81,14 @@ public:
     Velmark::int32 onSize(const Velmark::ViewRect& rect) override
     {
         m_calls.push_back("on size " + std::to_string(rect.right) + " x " + std::to_string(rect.bottom));
-        return CPluginView::onSize(rect);
+        const Velmark::int32 result = CPluginView::onSize(rect);
+        duringCall();
+        return result;
     }
     Velmark::int32 onFocus(bool state) override
     {
         m_calls.push_back(state ? "focus" : "no focus");
+        duringCall();
         return Velmark::ResultOk;
     }
     Velmark::int32 setFrame(Velmark::IPlugFrame* given) override
@@ -95,13 +100,27 @@ public:
     Velmark::int32 checkSizeConstraint(Velmark::ViewRect& rect) override
     {
         rect.right = rect.right < 500 ? 500 : rect.right;
+        if (closesWhenConstrained)
+            duringCall();
         return Velmark::ResultOk;
     }
 
     Velmark::IPlugFrame* frame = nullptr;
     bool refusesParent = false;
+    /// What the view does in onSize and onFocus, and in checkSizeConstraint if told so.
+    std::function<void()> action;
+    bool closesWhenConstrained = false;
 
 private:
+    void duringCall()
+    {
+        if (!action)
+            return;
+        const auto once = std::exchange(action, nullptr);
+        once();
+        m_calls.push_back("done");
+    }
+
     std::vector<std::string>& m_calls;
 };
 

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <functional>
 #include <utility>
 
 using namespace Velmark;
@@ -154,6 +155,31 @@ TEST_F(HostWindowTest, HoldsTheUserToSizesThatTheViewCanHave)
     EXPECT_EQ(taken(), (Calls{"size 500 x 300", "on size 500 x 300"}));
     m_windows.last->listener.resizedByUser(500, 300);
     EXPECT_EQ(taken(), Calls{"on size 500 x 300"});
+}
+
+TEST_F(HostWindowTest, KeepsAViewUntilItsCallIsOverThatClosesTheWindow)
+{
+    const Calls closing = {"removed", "no frame", "window closed", "closed", "done", "view gone"};
+    const auto callsOf = [&](const std::function<void(standin::NativeWindow::Listener&)>& event) {
+        make();
+        m_window->open();
+        taken();
+        m_view->action = [this] { m_window->show(false); };
+        event(m_windows.last->listener);
+        return taken();
+    };
+    const auto after = [&](const char* first) {
+        Calls calls = {first};
+        calls.insert(calls.end(), closing.begin(), closing.end());
+        return calls;
+    };
+    EXPECT_EQ(callsOf([](auto& listener) { listener.focusChanged(true); }), after("focus"));
+    EXPECT_EQ(callsOf([](auto& listener) { listener.resizedByUser(800, 300); }), after("on size 800 x 300"));
+    EXPECT_EQ(callsOf([this](auto& listener) {
+                  m_view->closesWhenConstrained = true;
+                  listener.resizedByUser(499, 300);
+              }),
+              closing);
 }
 
 TEST_F(HostWindowTest, TellsTheViewOfTheKeyboard)

@@ -65,6 +65,11 @@ TEST(WindowDescription, IsRefusedAsAWholeWhenItIsBroken)
     EXPECT_FALSE(read("<windows><window name=\"a\"/><window name=\"a\"/></windows>"));
     EXPECT_FALSE(read("<windows><window name=\"a\" resizable=\"yes\"/></windows>"));
     EXPECT_FALSE(read("<windows><window name=\"\xff\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\">text</window></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\"><window name=\"b\"/></window></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\"><![CDATA[text]]></window></windows>"));
+    EXPECT_TRUE(read("<windows><window name=\"a\"></window></windows>"));
+    EXPECT_TRUE(read("<windows><window name=\"a\"> <!-- Remark. --> </window></windows>"));
 }
 
 TEST(WindowDescription, IsNotReadFromAFolderOrFromNothing)

@@ -62,10 +62,10 @@ VirtualScreen::~VirtualScreen()
     waitpid(m_server, nullptr, 0);
 }
 
-void VirtualScreen::setDpi(int dpi)
+void VirtualScreen::setDpi(const std::string& dpi)
 {
     Display* const display = XOpenDisplay(nullptr);
-    const std::string resources = "Xft.dpi:\t" + std::to_string(dpi) + "\n";
+    const std::string resources = "Xft.dpi:\t" + dpi + "\n";
     XChangeProperty(display, DefaultRootWindow(display), XA_RESOURCE_MANAGER, XA_STRING, 8, PropModeReplace,
                     reinterpret_cast<const unsigned char*>(resources.data()), static_cast<int>(resources.size()));
     XCloseDisplay(display);

@@ -18,8 +18,8 @@ public:
     VirtualScreen& operator=(const VirtualScreen&) = delete;
     ~VirtualScreen();
 
-    /// What the user has set as dots per inch for all programs.
-    void setDpi(int dpi);
+    /// What the user has set as dots per inch for all programs; any text, as a user may have written it.
+    void setDpi(const std::string& dpi);
 
 private:
     pid_t m_server = 0;

@@ -45,10 +45,6 @@ void XUser::wheelUp()
 
 void XUser::press(unsigned long key, unsigned long held, unsigned long heldToo)
 {
-    const auto change = [this](unsigned long symbol, bool isDown) {
-        if (symbol != 0)
-            XTestFakeKeyEvent(m_display, XKeysymToKeycode(m_display, symbol), isDown ? True : False, CurrentTime);
-    };
     change(held, true);
     change(heldToo, true);
     change(key, true);
@@ -56,6 +52,24 @@ void XUser::press(unsigned long key, unsigned long held, unsigned long heldToo)
     change(heldToo, false);
     change(held, false);
     XSync(m_display, False);
+}
+
+void XUser::hold(unsigned long key)
+{
+    change(key, true);
+    XSync(m_display, False);
+}
+
+void XUser::release(unsigned long key)
+{
+    change(key, false);
+    XSync(m_display, False);
+}
+
+void XUser::change(unsigned long key, bool isDown)
+{
+    if (key != 0)
+        XTestFakeKeyEvent(m_display, XKeysymToKeycode(m_display, key), isDown ? True : False, CurrentTime);
 }
 
 unsigned long XUser::focus() const

@@ -21,12 +21,16 @@ public:
     void wheelUp();
     /// By keysym, with the key of another keysym held where that isn't 0.
     void press(unsigned long key, unsigned long held = 0, unsigned long heldToo = 0);
+    /// The key stays down until it is released.
+    void hold(unsigned long key);
+    void release(unsigned long key);
     /// Which window has the keyboard.
     unsigned long focus() const;
     void setFocus(unsigned long window);
 
 private:
     void button(unsigned int number);
+    void change(unsigned long key, bool isDown);
 
     _XDisplay* m_display;
 };

@@ -21,7 +21,7 @@ public:
         m_window = XCreateSimpleWindow(display, DefaultRootWindow(display), 40, 30, static_cast<unsigned>(width),
                                        static_cast<unsigned>(height), 0, 0, 0);
         XStoreName(display, m_window, title.c_str());
-        XSelectInput(display, m_window, StructureNotifyMask | FocusChangeMask | KeyPressMask);
+        XSelectInput(display, m_window, StructureNotifyMask | FocusChangeMask | KeyPressMask | KeyReleaseMask);
         m_owner.m_windows[m_window] = this;
         XSync(display, False);
     }
@@ -60,9 +60,15 @@ public:
             if (event.xfocus.detail != NotifyInferior)
                 m_listener.focusChanged(event.type == FocusIn);
             break;
-        case KeyPress: {
+        case KeyPress:
+        case KeyRelease: {
             XKeyEvent key = event.xkey;
-            m_owner.m_keys.push_back(XLookupKeysym(&key, 0));
+            KeySym symbol = NoSymbol;
+            XLookupString(&key, nullptr, 0, &symbol, nullptr);
+            m_owner.m_keyEvents.push_back((event.type == KeyPress ? "press " : "release ") +
+                                          std::string(XKeysymToString(symbol)));
+            if (event.type == KeyPress)
+                m_owner.m_keys.push_back(XLookupKeysym(&key, 0));
             break;
         }
         case DestroyNotify:

@@ -5,6 +5,7 @@
 #include "standin/window/WindowSystem.h"
 
 #include <map>
+#include <string>
 #include <vector>
 
 // Xlib's macros and other headers don't go together, so that this one names nothing of Xlib's.
@@ -28,8 +29,10 @@ public:
     /// Tells what has come from the server.
     void serve();
 
-    /// The keys that came to a window of the host, by their symbols.
+    /// The keys that were pressed in a window of the host, by the symbols that they have without another key held.
     const std::vector<unsigned long>& keys() const { return m_keys; }
+    /// The same keys as the user reads them, and when they came up: "press plus", "release plus".
+    const std::vector<std::string>& keyEvents() const { return m_keyEvents; }
     /// Ends a window behind the back of whoever has it.
     void destroy(standin::NativeWindow& window);
     /// What the screen shows at a place, as 0xRRGGBB.
@@ -41,6 +44,7 @@ private:
     _XDisplay* m_display;
     std::map<unsigned long, XWindow*> m_windows;
     std::vector<unsigned long> m_keys;
+    std::vector<std::string> m_keyEvents;
 };
 
 } // namespace cadrel::tests
