@@ -2,6 +2,7 @@
 
 #include "host/plugin/Cadrel.h"
 
+#include "gui/main/MainGui.h"
 #include "standin/Application.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/module/ModuleLoader.h"
@@ -34,6 +35,8 @@ using namespace Velmark;
 using cadrel::host::Cadrel;
 
 namespace {
+
+constexpr unsigned long Background = 0x2b2c2d;
 
 /// The stand-in's context with some of its services replaced; null takes one away.
 class OtherContext : public Implements<OtherContext, FObject, IHostContext> {
@@ -323,6 +326,32 @@ TEST_F(CadrelTest, OpensAWindowWithTheProjectThatIsActive)
     EXPECT_EQ(m_cadrel->getWindow(), m_application.views().windows().front().get());
 }
 
+TEST_F(CadrelTest, ShowsTheModelOfTheProjectThatIsActiveFromTheStart)
+{
+    auto& first = m_application.createProject();
+    m_application.activateProject(&first);
+    m_cadrel->initialize(m_application.context());
+    m_cadrel->handleAction("Cadrel", "ShowDialog", true);
+    ASSERT_EQ(m_application.views().windows().size(), 1U);
+    auto* const view = dynamic_cast<juce::Component*>(m_application.views().windows().front()->view());
+    ASSERT_NE(view, nullptr);
+    const auto* const content = dynamic_cast<cadrel::gui::MainGui*>(view->getChildComponent(0));
+    ASSERT_NE(content, nullptr);
+
+    const auto* const model = content->model();
+    EXPECT_NE(model, nullptr);
+    auto& second = m_application.createProject();
+    m_application.activateProject(&second);
+    EXPECT_NE(content->model(), nullptr);
+    EXPECT_NE(content->model(), model);
+    m_application.closeProject(second);
+    EXPECT_EQ(content->model(), nullptr);
+    m_application.activateProject(&first);
+    EXPECT_EQ(content->model(), model);
+    m_application.closeProject(first);
+    EXPECT_EQ(content->model(), nullptr);
+}
+
 TEST_F(CadrelTest, ForgetsAWindowThatDoesNotOpen)
 {
     const auto views = makeCounted<BrokenViews>();
@@ -371,18 +400,34 @@ TEST_F(CadrelTest, IsUnmappedAsAModuleOfAHostWithAJuceOfItsOwn)
         }
         return false;
     };
-    for (int round = 0; round < 10; ++round) {
-        {
-            const standin::ModuleLoader loader(m_application, module, m_bundle);
-            ASSERT_TRUE(isMapped());
-            ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
-            for (int count = 0; count < 10; ++count) {
-                m_windows.serve();
-                m_application.idle();
-                cadrel::host::JuceLayer::serve();
-                std::this_thread::sleep_for(std::chrono::milliseconds(5));
-            }
+    const auto countOf = [](const char* folder) {
+        return std::distance(std::filesystem::directory_iterator(folder), std::filesystem::directory_iterator());
+    };
+    const auto isDrawnInTime = [this] {
+        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+        while (m_windows.colourAt(400, 400) != Background && std::chrono::steady_clock::now() < end) {
+            m_windows.serve();
+            m_application.idle();
+            cadrel::host::JuceLayer::serve();
+            std::this_thread::sleep_for(std::chrono::milliseconds(5));
         }
+        return m_windows.colourAt(400, 400) == Background;
+    };
+    const auto loadAndUnload = [&] {
+        const standin::ModuleLoader loader(m_application, module, m_bundle);
+        ASSERT_TRUE(isMapped());
+        ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
+        ASSERT_TRUE(isDrawnInTime());
+    };
+    // What the first round opens for good, fonts for one, is the system's.
+    loadAndUnload();
+    ASSERT_FALSE(isMapped());
+    const auto threads = countOf("/proc/self/task");
+    const auto descriptors = countOf("/proc/self/fd");
+    for (int round = 0; round < 20; ++round) {
+        loadAndUnload();
         ASSERT_FALSE(isMapped()) << round;
+        EXPECT_EQ(countOf("/proc/self/task"), threads) << round;
+        EXPECT_EQ(countOf("/proc/self/fd"), descriptors) << round;
     }
 }
