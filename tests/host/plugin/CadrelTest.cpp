@@ -26,6 +26,7 @@
 #include <chrono>
 #include <filesystem>
 #include <fstream>
+#include <stdexcept>
 #include <string>
 #include <thread>
 #include <utility>
@@ -124,14 +125,15 @@ public:
     public:
         static constexpr const char* ClassName = "Window";
 
-        int32 open() override { return 7; }
+        int32 open() override { return opens ? ResultOk : 7; }
         int32 setCloseNotification(ICloseWindowNotification* given) override
         {
             listener = given;
             return ResultOk;
         }
-        int32 show(bool) override { return ResultOk; }
+        int32 show(bool) override { throw std::runtime_error("window"); }
 
+        bool opens = false;
         ICloseWindowNotification* listener = nullptr;
         Counted<IPlugView> view;
     };
@@ -140,6 +142,7 @@ public:
     int32 openWindow(const char* name, IViewBuilder* builder, IHostWindow** out) override
     {
         window = makeCounted<Window>();
+        window->opens = opens;
         builder->createView(name, nullptr, window->view.out());
         if (failsAfterTheView)
             return ResultFalse;
@@ -148,6 +151,7 @@ public:
     }
 
     Counted<Window> window;
+    bool opens = false;
     bool failsAfterTheView = false;
 };
 
@@ -377,6 +381,23 @@ TEST_F(CadrelTest, EndsAViewThatTheHostHasFoundNoWindowFor)
     EXPECT_EQ(m_cadrel->getWindow(), nullptr);
     Counted<IPlugView> next;
     EXPECT_EQ(m_cadrel->createView("CadrelWindow", nullptr, next.out()), ResultOk);
+}
+
+TEST_F(CadrelTest, EndsItsViewAlsoWhereAWindowOfTheHostThrows)
+{
+    const auto views = makeCounted<BrokenViews>();
+    views->opens = true;
+    m_context->replace<IViewManager>(views.get());
+    initialize();
+    ASSERT_EQ(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
+    auto* const view = dynamic_cast<juce::Component*>(views->window->view.get());
+    ASSERT_NE(view, nullptr);
+    ASSERT_EQ(view->getNumChildComponents(), 1);
+
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+    EXPECT_EQ(view->getNumChildComponents(), 0);
+    EXPECT_FALSE(m_cadrel->hasWindow(views->window.get()));
+    EXPECT_FALSE(isRegistered());
 }
 
 TEST_F(CadrelTest, TitlesItsCommandInTheLanguageThatTheHostKnowsBefore)
