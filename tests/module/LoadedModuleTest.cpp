@@ -27,7 +27,10 @@
 #include <thread>
 #include <vector>
 
+#include <X11/Xlib.h>
+
 #include <dlfcn.h>
+#include <unistd.h>
 
 using namespace Velmark;
 using cadrel::tests::VirtualScreen;
@@ -285,6 +288,18 @@ TEST_F(LoadedModuleTest, SurvivesAWindowOfTheHostThatGoesFirst)
 
     ASSERT_TRUE(openWindow());
     EXPECT_TRUE(turnUntil([this] { return isDrawn(); }));
+}
+
+TEST_F(LoadedModuleTest, StaysInMemoryWhereSomebodyMayStillCallItsErrorHandler)
+{
+    // It can't be taken back, so a process of its own tries it.
+    const auto isStillMapped = [this] {
+        load();
+        XSetErrorHandler([](Display*, XErrorEvent*) { return 0; });
+        unload();
+        return isMapped();
+    };
+    EXPECT_EXIT(_exit(isStillMapped() ? 0 : 1), testing::ExitedWithCode(0), "");
 }
 
 TEST_F(LoadedModuleTest, LetsGoOfAViewThatTheHostKeeps)

@@ -103,10 +103,8 @@ int32 Cadrel::terminate()
 {
     if (!m_context)
         return ResultOk;
-    resultOf([&] {
-        closeWindow();
-        disposeView();
-    });
+    resultOf([&] { closeWindow(); });
+    disposeView();
     m_layer.reset();
     m_registration.run();
     m_viewManager.reset();
@@ -161,13 +159,12 @@ void Cadrel::closeWindow()
         return;
     // The host may end the window in this call.
     const auto held = Counted<IHostWindow>::share(m_window);
-    held->show(false);
-    if (m_window)
+    resultOf([&] { held->show(false); });
+    if (std::exchange(m_window, nullptr))
         held->setCloseNotification(nullptr);
-    m_window = nullptr;
 }
 
-void Cadrel::disposeView()
+void Cadrel::disposeView() noexcept
 {
     if (m_view)
         m_view->dispose();
@@ -203,7 +200,7 @@ int32 Cadrel::windowClosed(IHostWindow* window)
 {
     if (window && window == m_window) {
         m_window = nullptr;
-        resultOf([&] { disposeView(); });
+        disposeView();
     }
     return ResultOk;
 }

@@ -55,7 +55,7 @@ private:
     Velmark::int32 showDialog(bool show);
     Velmark::int32 openWindow();
     void closeWindow();
-    void disposeView();
+    void disposeView() noexcept;
     /// A view that the host has given back without closing its window is over.
     void dropUnusedView();
 

@@ -17,8 +17,13 @@ namespace cadrel::host {
 
 namespace {
 
+/// Whom ours hands errors on to.
 XErrorHandler previousHandler = nullptr;
-bool isInstalled = false;
+/// The one that was there before the first of ours: whom ours hands on to when the previous one has come back to it.
+XErrorHandler firstHandler = nullptr;
+/// Another handler was installed over ours, and may know of it.
+bool isBelowAnother = false;
+thread_local bool isHandingOn = false;
 
 /// JUCE serves the connections that it has opened by their descriptors.
 bool isOurs(Display* display)
@@ -31,7 +36,11 @@ bool isOurs(Display* display)
 
 int handleError(Display* display, XErrorEvent* error)
 {
-    return isOurs(display) || !previousHandler ? 0 : previousHandler(display, error);
+    const XErrorHandler next = isHandingOn ? firstHandler : previousHandler;
+    if (isOurs(display) || !next)
+        return 0;
+    const juce::ScopedValueSetter<bool> handingOn(isHandingOn, true);
+    return next(display, error);
 }
 
 } // namespace
@@ -39,21 +48,21 @@ int handleError(Display* display, XErrorEvent* error)
 XErrors::XErrors()
 {
     const XErrorHandler current = XSetErrorHandler(handleError);
-    if (current == handleError || isInstalled)
-        XSetErrorHandler(current);
-    else
-        previousHandler = current;
-    isInstalled = true;
+    if (current == handleError)
+        return;
+    if (!isBelowAnother)
+        firstHandler = current;
+    previousHandler = current;
 }
 
 XErrors::~XErrors()
 {
     const XErrorHandler current = XSetErrorHandler(previousHandler);
-    if (current == handleError) {
-        isInstalled = false;
+    previousHandler = firstHandler;
+    if (current == handleError)
         return;
-    }
     XSetErrorHandler(current);
+    isBelowAnother = true;
     util::pinModule();
 }
 

@@ -9,7 +9,7 @@ namespace cadrel::host {
 /// which the server refuses what is asked of ours.
 ///
 /// There is one at a time. If somebody installs another handler and leaves it there, this one can't be taken out again. The
-/// module then stays in memory, and the next object finds its handler in place.
+/// module then stays in memory, and the next object installs its handler over the other one.
 class XErrors {
 public:
     XErrors();

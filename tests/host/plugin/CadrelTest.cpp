@@ -2,6 +2,7 @@
 
 #include "host/plugin/Cadrel.h"
 
+#include "gui/main/MainGui.h"
 #include "standin/Application.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/module/ModuleLoader.h"
@@ -25,6 +26,7 @@
 #include <chrono>
 #include <filesystem>
 #include <fstream>
+#include <stdexcept>
 #include <string>
 #include <thread>
 #include <utility>
@@ -34,6 +36,8 @@ using namespace Velmark;
 using cadrel::host::Cadrel;
 
 namespace {
+
+constexpr unsigned long Background = 0x2b2c2d;
 
 /// The stand-in's context with some of its services replaced; null takes one away.
 class OtherContext : public Implements<OtherContext, FObject, IHostContext> {
@@ -121,14 +125,15 @@ public:
     public:
         static constexpr const char* ClassName = "Window";
 
-        int32 open() override { return 7; }
+        int32 open() override { return opens ? ResultOk : 7; }
         int32 setCloseNotification(ICloseWindowNotification* given) override
         {
             listener = given;
             return ResultOk;
         }
-        int32 show(bool) override { return ResultOk; }
+        int32 show(bool) override { throw std::runtime_error("window"); }
 
+        bool opens = false;
         ICloseWindowNotification* listener = nullptr;
         Counted<IPlugView> view;
     };
@@ -137,6 +142,7 @@ public:
     int32 openWindow(const char* name, IViewBuilder* builder, IHostWindow** out) override
     {
         window = makeCounted<Window>();
+        window->opens = opens;
         builder->createView(name, nullptr, window->view.out());
         if (failsAfterTheView)
             return ResultFalse;
@@ -145,6 +151,7 @@ public:
     }
 
     Counted<Window> window;
+    bool opens = false;
     bool failsAfterTheView = false;
 };
 
@@ -323,6 +330,32 @@ TEST_F(CadrelTest, OpensAWindowWithTheProjectThatIsActive)
     EXPECT_EQ(m_cadrel->getWindow(), m_application.views().windows().front().get());
 }
 
+TEST_F(CadrelTest, ShowsTheModelOfTheProjectThatIsActiveFromTheStart)
+{
+    auto& first = m_application.createProject();
+    m_application.activateProject(&first);
+    m_cadrel->initialize(m_application.context());
+    m_cadrel->handleAction("Cadrel", "ShowDialog", true);
+    ASSERT_EQ(m_application.views().windows().size(), 1U);
+    auto* const view = dynamic_cast<juce::Component*>(m_application.views().windows().front()->view());
+    ASSERT_NE(view, nullptr);
+    const auto* const content = dynamic_cast<cadrel::gui::MainGui*>(view->getChildComponent(0));
+    ASSERT_NE(content, nullptr);
+
+    const auto* const model = content->model();
+    EXPECT_NE(model, nullptr);
+    auto& second = m_application.createProject();
+    m_application.activateProject(&second);
+    EXPECT_NE(content->model(), nullptr);
+    EXPECT_NE(content->model(), model);
+    m_application.closeProject(second);
+    EXPECT_EQ(content->model(), nullptr);
+    m_application.activateProject(&first);
+    EXPECT_EQ(content->model(), model);
+    m_application.closeProject(first);
+    EXPECT_EQ(content->model(), nullptr);
+}
+
 TEST_F(CadrelTest, ForgetsAWindowThatDoesNotOpen)
 {
     const auto views = makeCounted<BrokenViews>();
@@ -350,6 +383,23 @@ TEST_F(CadrelTest, EndsAViewThatTheHostHasFoundNoWindowFor)
     EXPECT_EQ(m_cadrel->createView("CadrelWindow", nullptr, next.out()), ResultOk);
 }
 
+TEST_F(CadrelTest, EndsItsViewAlsoWhereAWindowOfTheHostThrows)
+{
+    const auto views = makeCounted<BrokenViews>();
+    views->opens = true;
+    m_context->replace<IViewManager>(views.get());
+    initialize();
+    ASSERT_EQ(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
+    auto* const view = dynamic_cast<juce::Component*>(views->window->view.get());
+    ASSERT_NE(view, nullptr);
+    ASSERT_EQ(view->getNumChildComponents(), 1);
+
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+    EXPECT_EQ(view->getNumChildComponents(), 0);
+    EXPECT_FALSE(m_cadrel->hasWindow(views->window.get()));
+    EXPECT_FALSE(isRegistered());
+}
+
 TEST_F(CadrelTest, TitlesItsCommandInTheLanguageThatTheHostKnowsBefore)
 {
     m_application.translations().setLanguage("de");
@@ -371,18 +421,34 @@ TEST_F(CadrelTest, IsUnmappedAsAModuleOfAHostWithAJuceOfItsOwn)
         }
         return false;
     };
-    for (int round = 0; round < 10; ++round) {
-        {
-            const standin::ModuleLoader loader(m_application, module, m_bundle);
-            ASSERT_TRUE(isMapped());
-            ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
-            for (int count = 0; count < 10; ++count) {
-                m_windows.serve();
-                m_application.idle();
-                cadrel::host::JuceLayer::serve();
-                std::this_thread::sleep_for(std::chrono::milliseconds(5));
-            }
+    const auto countOf = [](const char* folder) {
+        return std::distance(std::filesystem::directory_iterator(folder), std::filesystem::directory_iterator());
+    };
+    const auto isDrawnInTime = [this] {
+        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+        while (m_windows.colourAt(400, 400) != Background && std::chrono::steady_clock::now() < end) {
+            m_windows.serve();
+            m_application.idle();
+            cadrel::host::JuceLayer::serve();
+            std::this_thread::sleep_for(std::chrono::milliseconds(5));
         }
+        return m_windows.colourAt(400, 400) == Background;
+    };
+    const auto loadAndUnload = [&] {
+        const standin::ModuleLoader loader(m_application, module, m_bundle);
+        ASSERT_TRUE(isMapped());
+        ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
+        ASSERT_TRUE(isDrawnInTime());
+    };
+    // What the first round opens for good, fonts for one, is the system's.
+    loadAndUnload();
+    ASSERT_FALSE(isMapped());
+    const auto threads = countOf("/proc/self/task");
+    const auto descriptors = countOf("/proc/self/fd");
+    for (int round = 0; round < 20; ++round) {
+        loadAndUnload();
         ASSERT_FALSE(isMapped()) << round;
+        EXPECT_EQ(countOf("/proc/self/task"), threads) << round;
+        EXPECT_EQ(countOf("/proc/self/fd"), descriptors) << round;
     }
 }
