@@ -86,7 +86,8 @@ public:
     /// model is empty then.
     void load();
     /// Replaces what is stored. After a failure, what was stored before is there, but when it is the previewed events alone
-    /// that can't be stored, the rest is.
+    /// that can't be stored, the rest is. After a load that failed because another version has stored it, the first save puts
+    /// that aside, under keys of its own.
     void save();
 
     /// The host's rate, as it was when it told of changes last. Throws Result::NotSupported for a rate that isn't one.
@@ -292,6 +293,7 @@ private:
     mutable core::Framerate m_framerate; ///< unknown until it's read
     const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
     ProjectEnd m_end;
+    bool m_isOfOtherVersion = false; ///< what is stored, so that it couldn't be read
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;
     std::vector<Track> m_lockedTracks;

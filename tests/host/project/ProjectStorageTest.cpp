@@ -252,6 +252,42 @@ TEST_F(ProjectStorageTest, ANewerVersionIsRefused)
     EXPECT_EQ(loadFailure(), Result::NewerVersion);
 }
 
+TEST_F(ProjectStorageTest, TheFirstSaveAfterANewerVersionPutsThatAside)
+{
+    const Bytes newer = bytesOf("02 00 00 00");
+    store(newer);
+    const std::int64_t checksum = stored(AttributeKey::StorageChecksum).asInteger();
+    Project opened(host.context(), host.document());
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::NewerVersion);
+    EXPECT_EQ(host.root()->hasAttribute(AttributeKey::OtherStorage), ResultFalse);
+
+    opened.save();
+    const auto list = query<IAttributeData>(stored(AttributeKey::OtherStorage).asObject());
+    ASSERT_TRUE(list);
+    Bytes kept(static_cast<std::size_t>(list->getBinarySize(AttributeKey::StorageData)));
+    ASSERT_EQ(list->getBinary(AttributeKey::StorageData, kept.data(), static_cast<int32>(kept.size())), ResultOk);
+    EXPECT_EQ(kept, newer);
+    EXPECT_EQ(stored(AttributeKey::OtherStorageChecksum).asInteger(), checksum);
+    EXPECT_EQ(storedBlock(), contentOf(opened.model()));
+
+    // What was put aside isn't replaced by what this program has written.
+    opened.model().newEdl().add(makeEvent("B", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00", 1));
+    opened.save();
+    EXPECT_EQ(stored(AttributeKey::OtherStorageChecksum).asInteger(), checksum);
+}
+
+TEST_F(ProjectStorageTest, ASaveAfterAnyOtherFailurePutsNothingAside)
+{
+    store(contentOf(host.adapter.model()), 0);
+    Project opened(host.context(), host.document());
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::ChecksumMismatch);
+
+    opened.save();
+
+    EXPECT_EQ(host.root()->hasAttribute(AttributeKey::OtherStorage), ResultFalse);
+    EXPECT_EQ(host.root()->hasAttribute(AttributeKey::OtherStorageChecksum), ResultFalse);
+}
+
 TEST_F(ProjectStorageTest, ANewerVersionWithinIsRefused)
 {
     // The model in its version, the old EDL in one to come.
