@@ -8,6 +8,7 @@
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
+#include "host/project/FramerateScope.h"
 #include "host/project/Project.h"
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
@@ -310,6 +311,11 @@ Result::Type Host::edit(Project& project, const EntryName& name, const std::func
         m_editedProject = nullptr;
     }
     m_processing = false;
+        // What the host has told of this edit was ignored.
+        resultOf([&] {
+            const FramerateScope rate(project);
+            project.rememberMemos();
+        });
     return result;
 }
 

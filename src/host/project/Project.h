@@ -205,6 +205,9 @@ public:
     /// The same: lets the memos follow their copies in the preview, and tells all listeners.
     void onProjectEdited(Velmark::IEditTransaction& transaction);
     void addListener(ProjectListener* listener) override { m_listeners.add(listener); }
+    /// Notes the copies of the memos as they are now, so that the next edit of the user's is told from what was there. To be
+    /// done after each edit of which onProjectChanged isn't called.
+    void rememberMemos();
     void removeListener(ProjectListener* listener) override { m_listeners.remove(listener); }
 
 private:
@@ -235,7 +238,6 @@ private:
     /// Where what is shown begins, from the time origin; nothing when nothing is. It doesn't move with the origin.
     std::optional<double> writtenFrom();
     void syncMemos(Velmark::IEditTransaction& transaction);
-    void rememberMemos();
 
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
