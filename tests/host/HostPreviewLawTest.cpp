@@ -29,6 +29,8 @@ class RandomPreviews {
 public:
     explicit RandomPreviews(Chance& chance) : run(chance), m_chance(chance)
     {
+        if (m_chance.oneIn(2))
+            run.includeOverhanging();
         // The change list stays the same, whatever is undone.
         m_film = filmOf(tracks());
         m_end = run.project.getEnd(nullptr);

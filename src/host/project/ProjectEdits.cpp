@@ -199,8 +199,12 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
     for (const SourceGroup& group : groupsOf(cut)) {
-        if (isBefore(group.source.start, group.source.end))
-            copyRange(group.tracks, group.source.start, group.source.end, group.destination + offset);
+        // What comes along of a clip that hangs over may have no room at the begin of the clock. Before the preview stretch
+        // it would never be taken away.
+        const double missing = std::max(-group.destination, 0.0);
+        const double start = group.source.start + missing;
+        if (isBefore(start, group.source.end))
+            copyRange(group.tracks, start, group.source.end, group.destination + missing + offset);
     }
     tick(cut.cutEvents().size());
     const Track& destinations = markerTrack(TrackRole::Destination);
