@@ -61,7 +61,7 @@ int32 Host::onIdle()
 {
     resultOf([this] { m_videoProvider->poll(); });
     // A progress window that lets idle calls through doesn't begin a second run within the first.
-    if (m_progress)
+    if (isBusy())
         return ResultOk;
     if (m_runRequested)
         serve(Action::Run, m_runRequested, [this] { return runCadrel(); });
@@ -130,7 +130,7 @@ Result::Type Host::startPreview(const core::EventList& events, std::uint64_t fir
 
 void Host::requireIdle() const
 {
-    if (m_served)
+    if (isBusy())
         throw Result::NotAvailable;
 }
 
@@ -285,6 +285,8 @@ Result::Type Host::withProgress(Project& project, const Appearance& appearance, 
 
 Result::Type Host::edit(Project& project, const EntryName& name, const std::function<void(IEditTransaction&)>& steps)
 {
+    if (m_processing)
+        return Result::NotAvailable;
     const PreviewEventsStep::Events previewedBefore = project.previewEvents().events();
     m_processing = true;
     IEditTransaction* const outer = namedEdit(project.document());
@@ -309,13 +311,13 @@ Result::Type Host::edit(Project& project, const EntryName& name, const std::func
             commit(project, name.incomplete);
         m_transaction.reset();
         m_editedProject = nullptr;
-    }
-    m_processing = false;
         // What the host has told of this edit was ignored.
         resultOf([&] {
             const FramerateScope rate(project);
             project.rememberMemos();
         });
+    }
+    m_processing = false;
     return result;
 }
 
@@ -361,7 +363,7 @@ void Host::requireActive(const Project& project) const
 
 Result::Type Host::endPreview()
 {
-    if (m_served)
+    if (isBusy())
         return Result::NotAvailable;
     const std::vector<std::int32_t> dropped = dropRequests();
     const std::shared_ptr<Project> held = m_currentProject;

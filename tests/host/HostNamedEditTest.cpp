@@ -81,10 +81,10 @@ TEST_P(HostNamedEditTest, LeavesTheChangeOpenWhenTheEndOfThePreviewFails)
     previewAll();
     const auto before = host.undoNames();
     const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->deletes = false;
+    host.altered.replace(IEditService::iid, edits);
     {
         const auto command = adapter().createCommand(L"Delete Event");
-        edits->deletes = false;
-        host.altered.replace(IEditService::iid, edits);
         EXPECT_NE(thrownBy([&] { adapter().setPreviewActive(false); }), Result::Ok);
         host.altered.unhide(IEditService::iid);
         EXPECT_EQ(host.undoNames(), before);
@@ -121,6 +121,57 @@ TEST_P(HostNamedEditTest, RefusesRequestsAndTheEndOfAPreviewWhileARunGoesOn)
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
     host.idle();
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+}
+
+TEST_P(HostNamedEditTest, RefusesRequestsAndTheEndOfAPreviewAtEachStepOfARun)
+{
+    const auto progress = makeCounted<WatchedProgress>();
+    host.altered.replace(IProgressService::iid, progress);
+    std::size_t asked = 0;
+    std::vector<Result::Type> answers;
+    progress->whenCalled = [&] {
+        if (!progress->calls.back().starts_with("tick"))
+            return;
+        ++asked;
+        answers.push_back(adapter().endPreview());
+        answers.push_back(thrownBy([&] { adapter().setPreviewActive(false); }));
+        adapter().onIdle();
+    };
+
+    ASSERT_EQ(adapter().startCadrel(), Result::Ok);
+    host.idle();
+
+    ASSERT_GT(asked, 0U);
+    EXPECT_EQ(answers, std::vector<Result::Type>(2 * asked, Result::NotAvailable));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostNamedEditTest, RefusesTheEndOfAPreviewAndRequestsWhileOneEnds)
+{
+    previewAll();
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    std::vector<Result::Type> answers;
+    edits->beforeDelete = [&] {
+        if (!answers.empty())
+            return;
+        answers.push_back(adapter().endPreview());
+        answers.push_back(thrownBy([&] { adapter().setPreviewActive(false); }));
+        answers.push_back(adapter().startCadrel());
+        answers.push_back(adapter().startPreview(changes(), 0, 0, 0));
+        adapter().onIdle();
+    };
+    host.altered.replace(IEditService::iid, edits);
+
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+
+    EXPECT_EQ(answers, std::vector<Result::Type>(4, Result::NotAvailable));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"Delete Preview Range"}));
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    EXPECT_TRUE(host.model().isPreviewActive());
+    EXPECT_FALSE(host.isEditOpen());
+    host.idle();
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview", u"Delete Preview Range"}));
 }
 
 } // namespace cadrel::host::tests
