@@ -83,7 +83,7 @@ public:
     /// Finds the tracks that are held locked and reads the stored model, if there is one, into the fresh project, and which
     /// events are previewed. If that can't be read, no memo follows its copy until the next preview. When no
     /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
-    /// model is empty then.
+    /// model is empty then. It is read also where the tracks can't be, for which HostObjectMissing is thrown.
     void load();
     /// Replaces what is stored. After a failure, what was stored before is there, but when it is the previewed events alone
     /// that can't be stored, the rest is. After a load that failed because another version has stored it, the first save puts

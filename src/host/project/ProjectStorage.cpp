@@ -120,8 +120,8 @@ void replaceStored(IProjectNode& project, const Stored& stored)
 
 void Project::load()
 {
-    findLockedTracks();
     FirstFailure failure;
+    // First, so that a track that can't be handled doesn't let the next save replace what nobody has read.
     failure.ofStep([this] {
         const Result::Type result = resultOf([this] { readModel(); });
         m_isOfOtherVersion = result == Result::NewerVersion || result == Result::UnknownVersion;
@@ -130,8 +130,9 @@ void Project::load()
             m_model.settings() = core::Settings();
         requireSuccess(result);
     });
+    failure.ofStep([this] { findLockedTracks(); });
     if (m_model.isPreviewActive()) {
-        findPreviewedTracks();
+        failure.ofStep([this] { findPreviewedTracks(); });
     } else {
         // There is no preview that the user could switch off. If a track can't be unlocked here, the next run unlocks
         // it.

@@ -89,6 +89,27 @@ struct UnreliableProject : FakeProject {
     int32 removeAttribute(const char* key) override { return kept.erase(key) == 1 ? ResultOk : ResultFalse; }
 };
 
+/// A project with a track that isn't to be had as one. What is stored is that of another.
+class UnusableTrackBesideStorage : public FakeProject {
+public:
+    explicit UnusableTrackBesideStorage(IProjectNode& stored) : FakeProject(0.0), m_stored(&stored)
+    {
+        children = withoutUsableTrack()->children;
+        isTrack = false;
+    }
+
+    int32 setAttribute(const char* key, const FVariant& value, bool flag) override
+    {
+        return m_stored->setAttribute(key, value, flag);
+    }
+    int32 getAttribute(const char* key, FVariant& value) override { return m_stored->getAttribute(key, value); }
+    int32 hasAttribute(const char* key) override { return m_stored->hasAttribute(key); }
+    int32 removeAttribute(const char* key) override { return m_stored->removeAttribute(key); }
+
+private:
+    IProjectNode* m_stored;
+};
+
 class ProjectStorageTest : public testing::Test {
 protected:
     void SetUp() override
@@ -548,6 +569,20 @@ TEST_F(ProjectStorageTest, UnlocksWhatItHeldForAPreviewThatIsGone)
     store(block, archiveOf(block).crc32() ^ 1U);
     EXPECT_EQ(loadFailure(), Result::ChecksumMismatch);
     expectUnlocked();
+}
+
+TEST_F(ProjectStorageTest, KeepsWhatIsStoredWhereTheTracksCannotBeRead)
+{
+    host.adapter.save();
+    const Bytes before = storedBlock();
+    const auto project = makeCounted<UnusableTrackBesideStorage>(*host.root());
+    Project opened(host.context(), project.get());
+
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::HostObjectMissing);
+    EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
+    opened.save();
+
+    EXPECT_EQ(storedBlock(), before);
 }
 
 TEST_F(ProjectStorageTest, GivesAnEmptyModelWhereTheTracksCannotBeRead)
