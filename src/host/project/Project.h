@@ -80,8 +80,8 @@ public:
 
     // Storage, as attributes of the host's project; in ProjectStorage.cpp.
 
-    /// Finds the tracks that are held locked and reads the stored model, if there is one, into the fresh project, and which
-    /// events are previewed. If that can't be read, no memo follows its copy until the next preview. When no
+    /// Reads the stored model, if there is one, into the fresh project, and which events are previewed, and finds the tracks
+    /// that are held locked. If the events can't be read, no memo follows its copy until the next preview. When no
     /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
     /// model is empty then. It is read also where the tracks can't be, for which HostObjectMissing is thrown.
     void load();
@@ -180,7 +180,8 @@ public:
     /// out all, and throws the first failure at the end.
     void rememberWritten();
     /// Unlocks the tracks and takes away what is kept as written. What the user has laid there since stays, and so does
-    /// what he has changed. Automation in the stretch stays only on tracks on which nothing was written.
+    /// what he has moved or given another length; a copy that he has changed in no other way than by its name, its gain or
+    /// the like goes. Automation in the stretch stays only on tracks on which nothing was written.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces.
@@ -204,10 +205,10 @@ public:
     void onProjectChanged();
     /// The same: lets the memos follow their copies in the preview, and tells all listeners.
     void onProjectEdited(Velmark::IEditTransaction& transaction);
-    void addListener(ProjectListener* listener) override { m_listeners.add(listener); }
     /// Notes the copies of the memos as they are now, so that the next edit of the user's is told from what was there. To be
     /// done after each edit of which onProjectChanged isn't called.
     void rememberMemos();
+    void addListener(ProjectListener* listener) override { m_listeners.add(listener); }
     void removeListener(ProjectListener* listener) override { m_listeners.remove(listener); }
 
 private:
