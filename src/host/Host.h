@@ -91,7 +91,7 @@ public:
     // What the window calls.
 
     /// All that keeps a run or a preview from being requested is answered, and nothing is thrown; what was requested before
-    /// stays as it is.
+    /// stays as it is. While one, or the end of a preview, is being carried out, the answer is Result::NotAvailable.
     util::Result::Type startCadrel() override;
     util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                     std::uint32_t options) override;
@@ -106,11 +106,13 @@ public:
     util::Result::Type setTransportCycle(double left, double right) override;
     util::Result::Type getTransportPosition(double& seconds) override;
     util::Result::Type setTransportPosition(double seconds) override;
+    /// Result::NotAvailable while a run or a preview, or the end of one, is being carried out.
     util::Result::Type endPreview() override;
     std::wstring getProjectName() override;
     core::MediaPoolInterface* getMediaPool() override;
     double getTimeOrigin() override;
-    /// Carries out all that belongs to it, and throws the first failure at the end.
+    /// Carries out all that belongs to it, and throws the first failure at the end. Throws Result::NotAvailable while a run
+    /// or a preview, or the end of one, is being carried out.
     void setPreviewActive(bool active) override;
     bool isPreviewActive() override;
 
@@ -192,10 +194,14 @@ private:
     /// The frame of a run or preview of so many events around its transaction.
     util::Result::Type withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,
                                     const std::function<void()>& work);
-    /// Carries out steps as one entry of the undo list. What they throw is the result, and the name of the entry says so.
+    /// Carries out steps as one entry of the undo list. What they throw is the result, and the name of the entry says so. In
+    /// a named change of the model that goes on, they become a part of its entry, which that change commits. Within an edit
+    /// there is no other: Result::NotAvailable, and nothing is done.
     util::Result::Type edit(Project& project, const EntryName& name,
                             const std::function<void(Velmark::IEditTransaction&)>& steps);
     util::Result::Type commit(Project& project, const char16_t* name);
+    /// What a result of the steps leaves to be noted: what they have written, and which events are shown.
+    util::Result::Type noteShown(Project& project, const std::vector<std::shared_ptr<core::EventBase>>& before);
     void takeBack(Project& project, Velmark::IActionManager& actions);
     /// Throws Result::NoProject unless the project is the active one.
     void requireActive(const Project& project) const;
@@ -204,6 +210,10 @@ private:
     Project* engineProject() const;
     void restoreCycles(Project& project);
     void keepCycles(Project& project);
+    /// Whether a run or a preview, or the end of one, is being carried out.
+    bool isBusy() const { return m_served || m_processing; }
+    /// Throws Result::NotAvailable while it is so.
+    void requireIdle() const;
     /// Makes sure that there is a preview offset, and throws what keeps a run from beginning.
     void prepareStart();
     /// The one that is open.

@@ -8,6 +8,7 @@
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
+#include "host/project/FramerateScope.h"
 #include "host/project/Project.h"
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
@@ -60,7 +61,7 @@ int32 Host::onIdle()
 {
     resultOf([this] { m_videoProvider->poll(); });
     // A progress window that lets idle calls through doesn't begin a second run within the first.
-    if (m_progress)
+    if (isBusy())
         return ResultOk;
     if (m_runRequested)
         serve(Action::Run, m_runRequested, [this] { return runCadrel(); });
@@ -100,6 +101,7 @@ void Host::tellDropped(const std::vector<std::int32_t>& actions)
 Result::Type Host::startCadrel()
 {
     return resultOf([this] {
+        requireIdle();
         prepareStart();
         m_runRequested = true;
     });
@@ -109,6 +111,7 @@ Result::Type Host::startPreview(const core::EventList& events, std::uint64_t fir
                                 std::uint32_t options)
 {
     return resultOf([&] {
+        requireIdle();
         prepareStart();
         core::DataModel& model = m_currentProject->model();
         std::optional<LoweredPreviewFlag> lowered;
@@ -123,6 +126,12 @@ Result::Type Host::startPreview(const core::EventList& events, std::uint64_t fir
         m_restorePreviewState = false;
         m_previewRequested = true;
     });
+}
+
+void Host::requireIdle() const
+{
+    if (isBusy())
+        throw Result::NotAvailable;
 }
 
 void Host::prepareStart()
@@ -233,7 +242,8 @@ Result::Type Host::finishPreview(const EntryName& name)
     return edit(project, name, [&](IEditTransaction& transaction) {
         project.previewEvents().clear();
         core::EditTransactionHandle handle(transaction);
-        const auto command = createCommand(handle);
+        // A named change that goes on has a snapshot of the model from before.
+        const auto command = namedEdit(project.document()) ? nullptr : createCommand(handle);
         m_videoProvider->apply(false, transaction, project.previewOffset());
         requireSuccess(CadrelerBase::endPreview());
         project.resetPreviewOffset();
@@ -275,42 +285,58 @@ Result::Type Host::withProgress(Project& project, const Appearance& appearance, 
 
 Result::Type Host::edit(Project& project, const EntryName& name, const std::function<void(IEditTransaction&)>& steps)
 {
-    core::EventList& previewed = project.previewEvents();
-    const PreviewEventsStep::Events previewedBefore = previewed.events();
+    if (m_processing)
+        return Result::NotAvailable;
+    const PreviewEventsStep::Events previewedBefore = project.previewEvents().events();
     m_processing = true;
+    IEditTransaction* const outer = namedEdit(project.document());
     Result::Type result = resultOf([&] {
         requireActive(project);
-        auto transaction = required(query<IEditTransaction>(required(service<IEditService>(m_serviceContext))));
-        requireOk(transaction->begin(true));
+        auto transaction = outer ? Counted<IEditTransaction>::share(outer)
+                                 : required(query<IEditTransaction>(required(service<IEditService>(m_serviceContext))));
+        if (!outer)
+            requireOk(transaction->begin(true));
         m_transaction = std::move(transaction);
         m_editedProject = &project;
         steps(*m_transaction);
         requireActive(project);
     });
     if (m_transaction) {
-        const Result::Type kept = resultOf([&] {
-            FirstFailure failure;
-            failure.ofStep([&] { project.rememberWritten(); });
-            failure.ofStep([&] {
-                if (previewed.events() != previewedBefore)
-                    requireOk(m_transaction->addStep(
-                        makeCounted<PreviewEventsStep>(project.sharedPreviewEvents(), previewedBefore).get()));
-            });
-            failure.raise();
-        });
-        // Otherwise a memo might be carried over to the wrong place.
-        if (kept != Result::Ok)
-            previewed.clear();
+        const Result::Type noted = noteShown(project, previewedBefore);
         if (result == Result::Ok)
-            result = kept;
-        if (result == Result::Ok)
+            result = noted;
+        if (!outer && result == Result::Ok)
             result = commit(project, name.done);
-        if (result != Result::Ok)
+        if (!outer && result != Result::Ok)
             commit(project, name.incomplete);
         m_transaction.reset();
         m_editedProject = nullptr;
+        // What the host has told of this edit was ignored.
+        resultOf([&] {
+            const FramerateScope rate(project);
+            project.rememberMemos();
+        });
     }
     m_processing = false;
+    return result;
+}
+
+Result::Type Host::noteShown(Project& project, const PreviewEventsStep::Events& before)
+{
+    core::EventList& previewed = project.previewEvents();
+    const Result::Type result = resultOf([&] {
+        FirstFailure failure;
+        failure.ofStep([&] { project.rememberWritten(); });
+        failure.ofStep([&] {
+            if (previewed.events() != before)
+                requireOk(m_transaction->addStep(
+                    makeCounted<PreviewEventsStep>(project.sharedPreviewEvents(), before).get()));
+        });
+        failure.raise();
+    });
+    // Otherwise a memo might be carried over to the wrong place.
+    if (result != Result::Ok)
+        previewed.clear();
     return result;
 }
 
@@ -337,6 +363,8 @@ void Host::requireActive(const Project& project) const
 
 Result::Type Host::endPreview()
 {
+    if (isBusy())
+        return Result::NotAvailable;
     const std::vector<std::int32_t> dropped = dropRequests();
     const std::shared_ptr<Project> held = m_currentProject;
     std::optional<LoweredPreviewFlag> lowered;
@@ -350,6 +378,7 @@ Result::Type Host::endPreview()
 
 void Host::setPreviewActive(bool active)
 {
+    requireIdle();
     const std::shared_ptr<Project> held = m_currentProject;
     if (!held)
         return;

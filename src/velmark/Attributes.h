@@ -120,6 +120,9 @@ struct AttributeKey {
     static constexpr const char* StorageData = "CaDrData";
     /// On the project: the CRC-32 of the block, an integer.
     static constexpr const char* StorageChecksum = "CaDs";
+    /// On the project: the two of another version of the program, which this one couldn't read and has replaced.
+    static constexpr const char* OtherStorage = "CaDrOther";
+    static constexpr const char* OtherStorageChecksum = "CaDsOther";
     /// On a track: 1 while Cadrel holds it locked, 0 afterwards.
     static constexpr const char* LockState = "Cadrel:LockState";
     /// On a track that a preview shows or that has something left of a run: an IAttributeData with numbers.

@@ -29,6 +29,8 @@ class RandomPreviews {
 public:
     explicit RandomPreviews(Chance& chance) : run(chance), m_chance(chance)
     {
+        if (m_chance.oneIn(2))
+            run.includeOverhanging();
         // The change list stays the same, whatever is undone.
         m_film = filmOf(tracks());
         m_end = run.project.getEnd(nullptr);
@@ -101,6 +103,15 @@ public:
             }
             now[index]["events"] = others;
         }
+        for (standin::Track* const track : run.project.allTracks()) {
+            if (!isOfMemos(*track))
+                continue;
+            for (const auto& memo : standin::tests::childrenOf(*track)) {
+                const std::string name = ConstString(memo->getName()).text8();
+                if (name.starts_with(Laid))
+                    laid.insert(describe(OfMemos, name, memo->getStart(nullptr), memo->getEnd(nullptr)));
+            }
+        }
         RC_ASSERT(laid == laidByUser());
         expectSame(now, m_film);
         if (m_laid.empty())
@@ -121,6 +132,8 @@ private:
     }
 
     static constexpr const char* Laid = "laid ";
+    /// In the place of the index of a track.
+    static constexpr std::size_t OfMemos = 1000;
 
     struct ByUser {
         std::u16string entry;
@@ -171,25 +184,34 @@ private:
     void lay()
     {
         const Tracks user = run.usersTracks();
-        std::vector<std::size_t> fitting;
+        std::vector<std::pair<std::size_t, standin::Track*>> fitting;
         for (std::size_t index = 0; index < user.size(); ++index) {
-            if (user[index]->kind() == standin::Track::Kind::Audio)
-                fitting.push_back(index);
+            if (user[index]->kind() == standin::Track::Kind::Audio ||
+                user[index]->kind() == standin::Track::Kind::Marker)
+                fitting.emplace_back(index, user[index]);
+        }
+        for (standin::Track* const track : run.project.allTracks()) {
+            if (isOfMemos(*track))
+                fitting.emplace_back(OfMemos, track);
         }
         if (fitting.empty())
             return;
-        const std::size_t index = m_chance.oneOf(fitting);
+        const auto [index, track] = m_chance.oneOf(fitting);
         const std::string name = Laid + std::to_string(m_laid.size());
         const double start =
             Day * static_cast<double>(m_chance.below(3)) + static_cast<double>(m_chance.below(4000)) + 2.0 * EndOfFilm;
         const double end = start + 1.0 + static_cast<double>(m_chance.below(30));
         const std::u16string entry(name.begin(), name.end());
-        const auto clip = makeCounted<standin::ClipEvent>();
-        clip->setName(entry);
-        clip->setSpan(start, end);
+        Counted<standin::Event> event;
+        if (track->kind() == standin::Track::Kind::Marker)
+            event = makeCounted<standin::Marker>(true);
+        else
+            event = makeCounted<standin::ClipEvent>();
+        event->setName(entry);
+        event->setSpan(start, end);
         standin::EditService& edits = run.application.edits();
         RC_ASSERT(edits.begin(true) == ResultOk);
-        clip->insertInto(*user[index]);
+        event->insertInto(*track);
         RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
         m_laid.push_back({entry, describe(index, name, start, end)});
     }
@@ -229,6 +251,13 @@ private:
             attributes.erase(AttributeKey::LockState);
             found.push_back(track);
         }
+    }
+    static bool isOfMemos(standin::Track& track)
+    {
+        FVariant role;
+        return track.kind() == standin::Track::Kind::Marker &&
+               track.getAttribute(AttributeKey::MarkerType, role) == ResultOk && role.isInteger() &&
+               (role.asInteger() & 0xff) == TrackRole::Memos;
     }
     static bool isOfSystem(const std::string& kind, const json& attributes)
     {

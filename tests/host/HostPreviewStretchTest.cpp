@@ -368,6 +368,84 @@ TEST_P(HostPreviewStretchTest, LeavesAMemoThatTheUserHasWrittenWhereTheNewCutHas
     EXPECT_EQ(host.contentOf(memos), (Texts{"too loud 2-2", "click 6-6", "needs sound 86404-86404"}));
 }
 
+TEST_P(HostPreviewStretchTest, LeavesOfCopiesOutsideOfTheNewCutThoseToWhichTheUserHasGivenAName)
+{
+    const Node memos = host.addTrack(TypeWord::Marker, u"Memos");
+    memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
+    host.addPointMarker(memos, u"click", host.inHost(6.0));
+    host.addPointMarker(memos, u"pop", host.inHost(7.0));
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    const auto moveAndName = [&](std::size_t index, double time, const char16_t* name) {
+        const Node copy = standin::tests::childrenOf(*memos)[index];
+        host.edit(u"Edit", [&] {
+            copy->setStart(nullptr, 0, Day + host.inHost(time));
+            copy->setName(nullptr, standin::tests::text(name).get(), 0);
+        });
+    };
+    ASSERT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop 7-7", "click 86416-86416", "pop 86417-86417"}));
+    moveAndName(3, 5.0, u"pop is too loud");
+    moveAndName(3, 4.0, u"click"); // the other one has taken its place
+    // One that was pasted.
+    FVariant id;
+    requireOk(standin::tests::childrenOf(*memos)[0]->getAttribute(AttributeKey::EventUserId, id));
+    const Node pasted = host.addPointMarker(memos, u"pasted", Day + host.inHost(3.0));
+    requireOk(pasted->setAttribute(AttributeKey::EventUserId, id, true));
+    ASSERT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop 7-7", "pasted 86403-86403", "click 86404-86404",
+                                            "pop is too loud 86405-86405"}));
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos),
+              (Texts{"click 6-6", "pop 7-7", "pasted 86403-86403", "pop is too loud 86405-86405"}));
+}
+
+// The begin of the clock.
+
+TEST(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHangsOver)
+{
+    using Spans = std::vector<Span>;
+    struct Case {
+        const char* dstIn;
+        const char* dstOut;
+        Span written;
+        double sourceOffset;
+    };
+    // Of the clip, four frames stand before the source.
+    for (const Case& at :
+         {Case{"00:00:00:00", "00:00:04:21", {0.0, 4.84}, 0.16}, Case{"00:00:00:03", "00:00:04:24", {0.0, 4.96}, 0.04},
+          Case{"00:00:00:04", "00:00:05:00", {0.0, 5.0}, 0.0}, Case{"00:00:00:05", "00:00:05:01", {0.04, 5.04}, 0.0}}) {
+        SCOPED_TRACE(at.dstIn);
+        AdaptedHost host(0.0);
+        const Node track = host.addTrack(TypeWord::Audio, u"DX");
+        host.addClip(track, u"one", 10.0, 20.0);
+        host.switchMarkersOff();
+        host.settings().setIncludeOverhangingAudioEvents(true);
+        host.carryOver("00:00:10:04", "00:00:15:00", at.dstIn, at.dstOut);
+        const auto expectSpans = [&](const Spans& expected) {
+            const auto events = standin::tests::childrenOf(*track);
+            ASSERT_EQ(events.size(), expected.size());
+            for (std::size_t index = 0; index < events.size(); ++index) {
+                EXPECT_NEAR(events[index]->getStart(nullptr), expected[index].first, 1e-6);
+                EXPECT_NEAR(events[index]->getEnd(nullptr), expected[index].second, 1e-6);
+            }
+        };
+
+        host.adapter().setPreviewActive(true);
+        host.preview(host.model().changeEdl());
+        expectSpans({{10.0, 20.0}, {Day + at.written.first, Day + at.written.second}});
+        EXPECT_NEAR(standin::tests::childrenOf(*track)[1]->getSourceOffset(nullptr), at.sourceOffset, 1e-6);
+
+        host.adapter().setPreviewActive(false);
+        expectSpans({{10.0, 20.0}});
+
+        host.conform();
+        expectSpans({at.written});
+        EXPECT_NEAR(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), at.sourceOffset, 1e-6);
+    }
+}
+
 // Locks.
 
 TEST_P(HostPreviewStretchTest, LocksItsTracksAgainWhenItsEmptyingIsUndone)

@@ -74,6 +74,13 @@ protected:
         return nullptr;
     }
     void edit(const std::function<void()>& edits) { host.edit(u"Edit", edits); }
+    /// A preview that has just been written while the user looks at where its events come from.
+    void previewAtItsSource()
+    {
+        adapter().setPreviewActive(true);
+        host.preview(firstChange(), 0, 0, false);
+        host.idle();
+    }
     /// A time of the film, in the preview, as the host counts it.
     double inPreview(double filmSeconds) { return Day + host.inHost(filmSeconds); }
 
@@ -1051,6 +1058,46 @@ TEST_P(HostMemoTest, FollowWhatTheUserDoesToTheirCopies)
 
     edit([&] { host.transaction()->remove(memos.get(), hiss.get()); });
     EXPECT_EQ(filmMemos(), (Texts{"pop 1-1", "click 7-7", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, StayWhenTheFirstEditIsAnotherMemoBesideThemAtTheirSource)
+{
+    previewAtItsSource();
+
+    host.addPointMarker(memos, u"late", host.inHost(5.0));
+
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "late 5-5", "click 6-6", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, KeepTheFirstEditThatIsMadeToThemAtTheirSource)
+{
+    previewAtItsSource();
+    const Node hiss = standin::tests::childrenOf(*memos).front();
+
+    edit([&] {
+        hiss->setName(nullptr, standin::tests::text(u"hum").get(), 0);
+        hiss->setEnd(nullptr, 0, host.inHost(5.0));
+    });
+
+    EXPECT_EQ(filmMemos(), (Texts{"hum 2-5", "click 6-6", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, AreGoneWhenTheFirstEditRemovesThemAtTheirSource)
+{
+    previewAtItsSource();
+
+    edit([&] { host.transaction()->remove(memos.get(), standin::tests::childrenOf(*memos).front().get()); });
+
+    EXPECT_EQ(filmMemos(), (Texts{"click 6-6", "far 30-30"}));
+}
+
+TEST_P(HostMemoTest, FollowTheFirstEditOfTheirCopiesAlsoWhereTheirSourceIsLookedAt)
+{
+    previewAtItsSource();
+
+    edit([&] { copyOf(u"click")->setStart(nullptr, 0, inPreview(17.0)); });
+
+    EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 7-7", "far 30-30"}));
 }
 
 TEST_P(HostMemoTest, GoBackWithTheEditThatTheyFollowed)

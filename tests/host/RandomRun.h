@@ -95,6 +95,18 @@ public:
         RC_ASSERT(isLastEntry(u"Apply Cadrel"));
     }
 
+    /// Lets clips come along that hang over, also where there is no room for them at the begin of the clock.
+    void includeOverhanging()
+    {
+        core::Settings& settings = model().settings();
+        settings.setIncludeOverhangingAudioEvents(true);
+        settings.setSnippetThreshold(static_cast<std::int32_t>(m_chance.below(1000)));
+        settings.setSnippetUsesPercentage(false);
+        const core::Framerate rate = Timecode::framerate();
+        const std::int32_t source = firstFrame(rate) + frames(100, rate);
+        carryOver(source, m_chance.oneIn(2) ? firstFrame(rate) : 0, frames(40, rate), rate);
+    }
+
     bool isLastEntry(std::u16string_view name) const
     {
         const standin::UndoList& entries = project.undoList();
@@ -295,26 +307,31 @@ private:
             settings.setPreserveMaterial(origin + before, origin + before + static_cast<double>(m_chance.below(60)));
             settings.setRestrictRange(true);
         }
-        // The frames of a pulled-down clock don't begin with its hours.
         const core::Framerate rate = Timecode::framerate();
-        const auto firstFrame = static_cast<std::int32_t>(std::ceil(origin * rate.rate));
-        for (std::uint64_t count = 1 + m_chance.below(8); count > 0; --count)
-            carryOver(firstFrame, rate);
+        const std::int32_t begin = firstFrame(rate);
+        for (std::uint64_t count = 1 + m_chance.below(8); count > 0; --count) {
+            const std::int32_t source = begin + frames(100, rate);
+            const std::int32_t destination = begin + frames(100, rate);
+            carryOver(source, destination, frames(40, rate), rate);
+        }
         if (m_chance.oneIn(2)) {
             model().videoList().add(
-                core::VideoList::Entry("/picture/reel3_v12.mov", Timecode(firstFrame), Timecode(0, 0, 40, 0)), false);
+                core::VideoList::Entry("/picture/reel3_v12.mov", Timecode(begin), Timecode(0, 0, 40, 0)), false);
         }
     }
 
-    void carryOver(std::int32_t firstFrame, const core::Framerate& rate)
+    /// The frames of a pulled-down clock don't begin with its hours.
+    std::int32_t firstFrame(const core::Framerate& rate) const
     {
-        const auto frames = [&](std::uint64_t seconds) {
-            return static_cast<std::int32_t>(
-                m_chance.below(seconds * static_cast<std::uint64_t>(rate.framesPerSecond)));
-        };
-        const std::int32_t source = firstFrame + frames(100);
-        const std::int32_t destination = firstFrame + frames(100);
-        const std::int32_t length = frames(40);
+        return static_cast<std::int32_t>(std::ceil(project.timeOrigin() * rate.rate));
+    }
+    /// Fewer than those of so many seconds.
+    std::int32_t frames(std::uint64_t seconds, const core::Framerate& rate)
+    {
+        return static_cast<std::int32_t>(m_chance.below(seconds * static_cast<std::uint64_t>(rate.framesPerSecond)));
+    }
+    void carryOver(std::int32_t source, std::int32_t destination, std::int32_t length, const core::Framerate& rate)
+    {
         const auto event = std::make_shared<core::EventBase>();
         event->setRollName("A001");
         event->setTimecodes(Timecode(source), Timecode(source + length), Timecode(destination),

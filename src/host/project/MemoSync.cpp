@@ -3,6 +3,7 @@
 #include "host/project/MemoSync.h"
 
 #include "core/edl/EventBase.h"
+#include "host/track/CoveredRanges.h"
 #include "host/track/Instant.h"
 #include "host/track/Marker.h"
 #include "host/track/Track.h"
@@ -10,12 +11,52 @@
 #include <algorithm>
 #include <cmath>
 #include <iterator>
+#include <limits>
+#include <span>
 #include <utility>
 
 using cadrel::core::SecondsRange;
 using Velmark::IEditTransaction;
 
 namespace cadrel::host {
+
+/// A memo where it stands, in seconds of the project's clock.
+struct PlacedMemo {
+    HostEvent event;
+    SecondsRange span;
+};
+
+/// The memos of a track where they stood when they were read, in the order of their starts.
+class PlacedMemos {
+public:
+    explicit PlacedMemos(const Track& track)
+    {
+        for (HostEvent& event : track.clipEvents()) {
+            const SecondsRange span{event.getStart(), event.getEnd()};
+            m_memos.push_back({std::move(event), span});
+        }
+        std::ranges::stable_sort(m_memos, {}, [](const PlacedMemo& memo) { return memo.span.start; });
+        double latest = std::numeric_limits<double>::lowest();
+        for (const PlacedMemo& memo : m_memos)
+            m_latestEnds.push_back(latest = std::max(latest, memo.span.end));
+    }
+
+    const std::vector<PlacedMemo>& all() const { return m_memos; }
+    /// Those that may have something in a range, and perhaps some before it.
+    std::span<const PlacedMemo> touching(const SecondsRange& range) const
+    {
+        const auto first =
+            std::ranges::partition_point(m_latestEnds, [&range](double end) { return isBefore(end, range.start); });
+        const auto last = std::ranges::partition_point(
+            m_memos, [&range](const PlacedMemo& memo) { return isBefore(memo.span.start, range.end); });
+        const auto from = m_memos.begin() + (first - m_latestEnds.begin());
+        return from < last ? std::span(from, last) : std::span<const PlacedMemo>();
+    }
+
+private:
+    std::vector<PlacedMemo> m_memos;
+    std::vector<double> m_latestEnds; ///< of each memo and those before it
+};
 
 namespace {
 
@@ -24,23 +65,15 @@ bool isEmpty(const SecondsRange& range)
     return !isBefore(range.start, range.end);
 }
 
-/// What a later event has left of ranges on which it was written.
-std::vector<SecondsRange> without(const std::vector<SecondsRange>& ranges, const SecondsRange& written)
+bool reachesInto(const SecondsRange& memo, const SecondsRange& range)
 {
-    std::vector<SecondsRange> left;
-    for (const SecondsRange& range : ranges) {
-        for (const SecondsRange& piece : {SecondsRange{range.start, std::min(range.end, written.start)},
-                                          SecondsRange{std::max(range.start, written.end), range.end}}) {
-            if (!isEmpty(piece))
-                left.push_back(piece);
-        }
-    }
-    return left;
+    return isBefore(memo.start, range.end) && isBefore(range.start, memo.end);
 }
 
-bool reachesInto(const HostEvent& memo, const SecondsRange& range)
+/// A range doesn't hold its end, and what is copied doesn't either.
+bool liesIn(const SecondsRange& memo, const SecondsRange& range)
 {
-    return isBefore(memo.getStart(), range.end) && isBefore(range.start, memo.getEnd());
+    return countsAsIn(memo, range) && isBefore(memo.start, range.end);
 }
 
 bool hasId(const std::vector<HostEvent>& memos, std::int64_t id)
@@ -75,49 +108,32 @@ double MemoSync::Stretch::toSource(double previewTime) const
 //     event i + 1                         |=============|      written later
 //     stretch of i      preview  |========|
 //                       source   |========|--------|
-std::vector<MemoSync::Stretch> MemoSync::stretchesOf(const Previewed& previewed, std::size_t index)
+std::vector<MemoSync::Shown> MemoSync::stretchesOf(const Previewed& previewed)
 {
-    const Events& events = previewed.events;
     const core::Framerate framerate = previewed.framerate;
     const double moved = previewed.moved;
     const double offset = previewed.offset + moved;
-    const auto isWritten = [](const core::EventBase& event) {
-        return !event.hasFlaw(core::EventFlaw::TimecodeInvalid) && event.srcIn() < event.srcOut() &&
-               event.dstIn() < event.dstOut();
-    };
-    const auto previewOf = [&](const core::EventBase& event) {
-        return SecondsRange{event.dstIn().toSeconds(framerate) + offset, event.dstOut().toSeconds(framerate) + offset};
-    };
-
-    const core::EventBase& event = *events[index];
-    if (!isWritten(event))
-        return {};
-    const SecondsRange whole = previewOf(event);
-    std::vector<SecondsRange> pieces{whole};
-    for (std::size_t later = index + 1; later < events.size(); ++later) {
-        if (isWritten(*events[later]))
-            pieces = without(pieces, previewOf(*events[later]));
+    std::vector<Shown> shown;
+    CoveredRanges later;
+    for (auto next = previewed.events.rbegin(); next != previewed.events.rend(); ++next) {
+        const core::EventBase& event = **next;
+        if (event.hasFlaw(core::EventFlaw::TimecodeInvalid) || !(event.srcIn() < event.srcOut()) ||
+            !(event.dstIn() < event.dstOut()))
+            continue;
+        const SecondsRange whole{event.dstIn().toSeconds(framerate) + offset,
+                                 event.dstOut().toSeconds(framerate) + offset};
+        const double srcIn = event.srcIn().toSeconds(framerate) + moved;
+        const double srcOut = event.srcOut().toSeconds(framerate) + moved;
+        const std::vector<SecondsRange> pieces = later.add(whole);
+        for (auto piece = pieces.rbegin(); piece != pieces.rend(); ++piece) {
+            const SecondsRange source{srcIn + (piece->start - whole.start),
+                                      std::min(srcIn + (piece->end - whole.start), srcOut)};
+            if (!isEmpty(source))
+                shown.push_back({*next, {source, *piece}, {}});
+        }
     }
-
-    const double srcIn = event.srcIn().toSeconds(framerate) + moved;
-    const double srcOut = event.srcOut().toSeconds(framerate) + moved;
-    std::vector<Stretch> stretches;
-    for (const SecondsRange& piece : pieces) {
-        const SecondsRange source{srcIn + (piece.start - whole.start),
-                                  std::min(srcIn + (piece.end - whole.start), srcOut)};
-        if (!isEmpty(source))
-            stretches.push_back({source, piece});
-    }
-    return stretches;
-}
-
-std::vector<HostEvent> MemoSync::memosIn(const Track& memos, const SecondsRange& range)
-{
-    const double origin = memos.timeOrigin();
-    std::vector<HostEvent> found = memos.eventsInRange(range.start - origin, range.end - origin);
-    // A range doesn't hold its end, and what is copied doesn't either.
-    std::erase_if(found, [&range](const HostEvent& memo) { return !isBefore(memo.getStart(), range.end); });
-    return found;
+    std::ranges::reverse(shown);
+    return shown;
 }
 
 MemoSync::Memo MemoSync::memoOf(const HostEvent& event)
@@ -131,32 +147,41 @@ const MemoSync::Memo* MemoSync::findById(const Memos& memos, std::int64_t id)
     return found != memos.end() ? &*found : nullptr;
 }
 
-MemoSync::Preview MemoSync::previewOf(const Track& memos, const Previewed& previewed)
+MemoSync::Preview MemoSync::previewOf(const PlacedMemos& memos, const Previewed& previewed)
 {
-    Preview preview;
-    for (std::size_t index = 0; index < previewed.events.size(); ++index) {
-        for (const Stretch& stretch : stretchesOf(previewed, index))
-            preview.shown.push_back({previewed.events[index], stretch, {}});
-    }
-
-    preview.adrift = memos.clipEvents();
-    std::erase_if(preview.adrift, [offset = previewed.offset + previewed.moved](const HostEvent& memo) {
-        return isBefore(memo.getEnd(), offset);
-    });
-    const auto give = [&preview](Shown& shown, const auto& belongs) {
-        std::erase_if(preview.adrift, [&](const HostEvent& memo) {
-            if (!belongs(memo))
-                return false;
-            shown.copies.push_back(memo);
-            return true;
-        });
-    };
-    for (Shown& shown : preview.shown) {
-        const std::vector<HostEvent> inside = memosIn(memos, shown.stretch.preview);
-        give(shown, [&](const HostEvent& memo) { return std::ranges::find(inside, memo) != inside.end(); });
-    }
+    Preview preview{stretchesOf(previewed), {}};
+    // They don't overlap.
+    std::vector<Shown*> inOrder;
     for (Shown& shown : preview.shown)
-        give(shown, [&](const HostEvent& memo) { return reachesInto(memo, shown.stretch.preview); });
+        inOrder.push_back(&shown);
+    std::ranges::sort(inOrder, {}, [](const Shown* shown) { return shown->stretch.preview.start; });
+
+    const double offset = previewed.offset + previewed.moved;
+    std::vector<std::pair<Shown*, HostEvent>> reaching;
+    for (const PlacedMemo& memo : memos.all()) {
+        if (isBefore(memo.span.end, offset))
+            continue;
+        Shown* inside = nullptr;
+        Shown* touched = nullptr;
+        const auto first = std::ranges::partition_point(
+            inOrder, [&](const Shown* shown) { return isBefore(shown->stretch.preview.end, memo.span.start); });
+        for (auto next = first; next != inOrder.end() && !isBefore(memo.span.end, (*next)->stretch.preview.start);
+             ++next) {
+            const SecondsRange& stretch = (*next)->stretch.preview;
+            if (liesIn(memo.span, stretch) && (!inside || *next < inside))
+                inside = *next;
+            if (reachesInto(memo.span, stretch) && (!touched || *next < touched))
+                touched = *next;
+        }
+        if (inside)
+            inside->copies.push_back(memo.event);
+        else if (touched)
+            reaching.emplace_back(touched, memo.event);
+        else
+            preview.adrift.push_back(memo.event);
+    }
+    for (const auto& [shown, memo] : reaching)
+        shown->copies.push_back(memo);
     return preview;
 }
 
@@ -165,29 +190,40 @@ void MemoSync::remember(const Track& memos, const Previewed& previewed)
     // After a failure nothing is known. What is known in part would look as if the user had written the rest.
     m_remembered.clear();
     std::map<std::shared_ptr<core::EventBase>, Memos> found;
-    for (const Shown& shown : previewOf(memos, previewed).shown)
-        std::ranges::transform(shown.copies, std::back_inserter(found[shown.event]), memoOf);
+    for (const auto& event : previewed.events)
+        found.try_emplace(event);
+    const PlacedMemos placed(memos);
+    if (!placed.all().empty()) {
+        for (const Shown& shown : previewOf(placed, previewed).shown)
+            std::ranges::transform(shown.copies, std::back_inserter(found[shown.event]), memoOf);
+    }
     m_remembered = std::move(found);
 }
 
 void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTransaction& transaction)
 {
-    const Preview preview = previewOf(memos, previewed);
+    PlacedMemos placed(memos);
+    if (placed.all().empty())
+        return;
+    const Preview preview = previewOf(placed, previewed);
     for (const Shown& shown : preview.shown) {
         const auto remembered = m_remembered.find(shown.event);
-        followStretch(memos, transaction, shown, preview.adrift,
-                      remembered != m_remembered.end() ? &remembered->second : nullptr);
+        if (followStretch(placed, memos, transaction, shown, preview.adrift,
+                          remembered != m_remembered.end() ? &remembered->second : nullptr))
+            placed = PlacedMemos(memos);
     }
 }
 
-void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, const Shown& shown,
-                             const std::vector<HostEvent>& adrift, const Memos* remembered)
+bool MemoSync::followStretch(const PlacedMemos& placed, const Track& memos, IEditTransaction& transaction,
+                             const Shown& shown, const std::vector<HostEvent>& adrift, const Memos* remembered)
 {
     const Stretch& stretch = shown.stretch;
     std::vector<HostEvent> copies = shown.copies;
-    std::vector<HostEvent> sources = sourcesOf(memos, stretch, copies);
+    std::vector<HostEvent> sources = sourcesOf(placed, stretch, copies);
     if (remembered)
         keepEdited(copies, sources, *remembered);
+    if (copies.empty() && sources.empty())
+        return false;
     const std::size_t copyCount = copies.size();
     const std::size_t sourceCount = sources.size();
 
@@ -215,16 +251,24 @@ void MemoSync::followStretch(const Track& memos, IEditTransaction& transaction, 
                 .insertInto(m_hostContext, transaction, memos);
         }
     }
+    return true;
 }
 
-std::vector<HostEvent> MemoSync::sourcesOf(const Track& memos, const Stretch& stretch,
+std::vector<HostEvent> MemoSync::sourcesOf(const PlacedMemos& memos, const Stretch& stretch,
                                            const std::vector<HostEvent>& copies)
 {
-    std::vector<HostEvent> found = memosIn(memos, stretch.source);
+    std::vector<HostEvent> found;
+    std::vector<HostEvent> reaching;
+    for (const PlacedMemo& memo : memos.touching(stretch.source)) {
+        if (liesIn(memo.span, stretch.source))
+            found.push_back(memo.event);
+        else if (reachesInto(memo.span, stretch.source))
+            reaching.push_back(memo.event);
+    }
     // A memo that only reaches into the stretch has its copy there, too.
-    for (HostEvent& memo : memos.clipEvents()) {
+    for (HostEvent& memo : reaching) {
         const std::int64_t id = memo.getUserId();
-        if (reachesInto(memo, stretch.source) && hasId(copies, id) && !hasId(found, id))
+        if (hasId(copies, id) && !hasId(found, id))
             found.push_back(std::move(memo));
     }
     return found;

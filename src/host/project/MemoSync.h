@@ -23,6 +23,7 @@ class EventBase;
 
 namespace cadrel::host {
 
+class PlacedMemos;
 class Track;
 
 /// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
@@ -82,17 +83,16 @@ private:
         std::vector<HostEvent> adrift; ///< in no stretch
     };
 
-    static std::vector<Stretch> stretchesOf(const Previewed& previewed, std::size_t index);
-    static Preview previewOf(const Track& memos, const Previewed& previewed);
-    static std::vector<HostEvent> memosIn(const Track& memos, const core::SecondsRange& range);
+    static std::vector<Shown> stretchesOf(const Previewed& previewed);
+    static Preview previewOf(const PlacedMemos& memos, const Previewed& previewed);
     static Memo memoOf(const HostEvent& event);
     /// Null when there is none.
     static const Memo* findById(const Memos& memos, std::int64_t id);
-    /// The memos of those adrift stay.
-    void followStretch(const Track& memos, Velmark::IEditTransaction& transaction, const Shown& shown,
-                       const std::vector<HostEvent>& adrift, const Memos* remembered);
+    /// The memos of those adrift stay. Returns whether the user has edited a copy or, where that isn't known, may have.
+    bool followStretch(const PlacedMemos& placed, const Track& memos, Velmark::IEditTransaction& transaction,
+                       const Shown& shown, const std::vector<HostEvent>& adrift, const Memos* remembered);
     /// The memos that a stretch shows.
-    static std::vector<HostEvent> sourcesOf(const Track& memos, const Stretch& stretch,
+    static std::vector<HostEvent> sourcesOf(const PlacedMemos& memos, const Stretch& stretch,
                                             const std::vector<HostEvent>& copies);
     /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
     static void keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered);

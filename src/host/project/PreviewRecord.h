@@ -41,7 +41,8 @@ public:
     double start() const { return m_start; }
     /// Of the last event or automation point; nothing when nothing is written.
     std::optional<double> end() const { return m_end; }
-    /// Those of the events that aren't written down here, or aren't as they were.
+    /// Those of the events that aren't written down here, or don't begin and end where they did. Nothing else of an event is
+    /// compared.
     std::vector<Node> others(std::vector<Node> events) const;
 
 private:

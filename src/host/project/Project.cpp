@@ -283,11 +283,11 @@ void Project::syncMemos(IEditTransaction& transaction)
 
 void Project::rememberMemos()
 {
+    // What is known of an earlier preview would be taken for edits of this one.
+    m_memoSync.forget();
     const Track& memos = markerTrack(TrackRole::Memos);
     if (isPreviewing() && memos.isAlive())
         m_memoSync.remember(memos, previewed());
-    else
-        m_memoSync.forget();
 }
 
 bool Project::isPreviewing() const

@@ -80,13 +80,14 @@ public:
 
     // Storage, as attributes of the host's project; in ProjectStorage.cpp.
 
-    /// Finds the tracks that are held locked and reads the stored model, if there is one, into the fresh project, and which
-    /// events are previewed. If that can't be read, no memo follows its copy until the next preview. When no
+    /// Reads the stored model, if there is one, into the fresh project, and which events are previewed, and finds the tracks
+    /// that are held locked. If the events can't be read, no memo follows its copy until the next preview. When no
     /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
-    /// model is empty then.
+    /// model is empty then. It is read also where the tracks can't be, for which HostObjectMissing is thrown.
     void load();
     /// Replaces what is stored. After a failure, what was stored before is there, but when it is the previewed events alone
-    /// that can't be stored, the rest is.
+    /// that can't be stored, the rest is. After a load that failed because another version has stored it, the first save puts
+    /// that aside, under keys of its own.
     void save();
 
     /// The host's rate, as it was when it told of changes last. Throws Result::NotSupported for a rate that isn't one.
@@ -179,7 +180,8 @@ public:
     /// out all, and throws the first failure at the end.
     void rememberWritten();
     /// Unlocks the tracks and takes away what is kept as written. What the user has laid there since stays, and so does
-    /// what he has changed. Automation in the stretch stays only on tracks on which nothing was written.
+    /// what he has moved or given another length; a copy that he has changed in no other way than by its name, its gain or
+    /// the like goes. Automation in the stretch stays only on tracks on which nothing was written.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces.
@@ -203,6 +205,9 @@ public:
     void onProjectChanged();
     /// The same: lets the memos follow their copies in the preview, and tells all listeners.
     void onProjectEdited(Velmark::IEditTransaction& transaction);
+    /// Notes the copies of the memos as they are now, so that the next edit of the user's is told from what was there. To be
+    /// done after each edit of which onProjectChanged isn't called.
+    void rememberMemos();
     void addListener(ProjectListener* listener) override { m_listeners.add(listener); }
     void removeListener(ProjectListener* listener) override { m_listeners.remove(listener); }
 
@@ -234,7 +239,6 @@ private:
     /// Where what is shown begins, from the time origin; nothing when nothing is. It doesn't move with the origin.
     std::optional<double> writtenFrom();
     void syncMemos(Velmark::IEditTransaction& transaction);
-    void rememberMemos();
 
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
@@ -292,6 +296,7 @@ private:
     mutable core::Framerate m_framerate; ///< unknown until it's read
     const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
     ProjectEnd m_end;
+    bool m_isOfOtherVersion = false; ///< what is stored, so that it couldn't be read
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;
     std::vector<Track> m_lockedTracks;

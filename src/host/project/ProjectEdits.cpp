@@ -12,6 +12,7 @@
 #include "host/border/NodeReading.h"
 #include "host/project/Project.h"
 #include "host/track/AutomationCurve.h"
+#include "host/track/CoveredRanges.h"
 #include "host/track/CutEvent.h"
 #include "host/track/Instant.h"
 #include "host/track/Marker.h"
@@ -83,31 +84,8 @@ std::vector<SourceGroup> groupsOf(const core::Cut& cut)
 struct GapTrack {
     std::vector<AutomationCurve> curves;
     /// What the cuts have written, and the gaps that are filled. In seconds, without the offset.
-    std::vector<SecondsRange> done;
+    CoveredRanges done;
 };
-
-/// Adds a stretch to ranges that are in order and don't touch, and returns the pieces of it that none of them covered.
-std::vector<SecondsRange> cover(std::vector<SecondsRange>& ranges, const SecondsRange& stretch)
-{
-    const auto first = std::ranges::partition_point(
-        ranges, [&stretch](const SecondsRange& range) { return isBefore(range.end, stretch.start); });
-    SecondsRange whole = stretch;
-    if (first != ranges.end())
-        whole.start = std::min(whole.start, first->start);
-    std::vector<SecondsRange> pieces;
-    double covered = stretch.start;
-    auto behind = first;
-    for (; behind != ranges.end() && !isBefore(stretch.end, behind->start); ++behind) {
-        if (isBefore(covered, behind->start))
-            pieces.push_back({covered, behind->start});
-        covered = std::max(covered, behind->end);
-    }
-    if (isBefore(covered, stretch.end))
-        pieces.push_back({covered, stretch.end});
-    whole.end = std::max(whole.end, covered);
-    ranges.insert(ranges.erase(first, behind), whole);
-    return pieces;
-}
 
 using GapTracks = std::map<const ITrackNode*, GapTrack>;
 
@@ -122,17 +100,10 @@ GapTracks gapTracksOf(const std::vector<Track>& tracks, const core::CutList& cut
             const auto ofTrack = found.find(hostEvent(cutEvent).track().node());
             const SecondsRange written = cutEvent->written();
             if (ofTrack != found.end() && isBefore(written.start, written.end))
-                cover(ofTrack->second.done, written);
+                ofTrack->second.done.add(written);
         }
     }
     return found;
-}
-
-/// What of `range` none of the ranges covers, which are in order and don't touch.
-std::vector<SecondsRange> gapsBetween(const std::vector<SecondsRange>& ranges, const SecondsRange& range)
-{
-    std::vector<SecondsRange> covered = ranges;
-    return cover(covered, range);
 }
 
 std::vector<const Track*> pointersTo(const std::vector<Track>& tracks)
@@ -199,8 +170,12 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
     for (const SourceGroup& group : groupsOf(cut)) {
-        if (isBefore(group.source.start, group.source.end))
-            copyRange(group.tracks, group.source.start, group.source.end, group.destination + offset);
+        // What comes along of a clip that hangs over may have no room at the begin of the clock. Before the preview stretch
+        // it would never be taken away.
+        const double missing = std::max(-group.destination, 0.0);
+        const double start = group.source.start + missing;
+        if (isBefore(start, group.source.end))
+            copyRange(group.tracks, start, group.source.end, group.destination + missing + offset);
     }
     tick(cut.cutEvents().size());
     const Track& destinations = markerTrack(TrackRole::Destination);
@@ -251,9 +226,8 @@ void Project::holdAutomation(IEditTransaction& transaction, const core::CutList&
     // A preview shows what lies beyond the range too.
     end = isPart ? end : offset;
     for (auto& [node, track] : gapTracksOf(automatedTracks(), cuts)) {
-        const std::vector<SecondsRange>& written = track.done;
         const std::vector<SecondsRange> gaps =
-            isPart || !written.empty() ? gapsBetween(written, {start, end}) : std::vector<SecondsRange>();
+            isPart || !track.done.isEmpty() ? track.done.uncovered({start, end}) : std::vector<SecondsRange>();
         for (AutomationCurve& curve : track.curves) {
             for (const SecondsRange& gap : gaps) {
                 const bool isFirst = !isBefore(start, gap.start);
@@ -299,7 +273,7 @@ void Project::markVirginTerritories(IEditTransaction& transaction, const core::C
             if (!(b.track() == a.track()) || ofTrack == tracks.end() || !isLongEnough(gap))
                 continue;
             auto& [curves, done] = ofTrack->second;
-            for (const SecondsRange& piece : cover(done, gap)) {
+            for (const SecondsRange& piece : done.add(gap)) {
                 if (isLongEnough(piece))
                     a.track().fillAutomationGap(transaction, curves, piece.start + offset, piece.end + offset);
             }

@@ -4,8 +4,10 @@
 
 #include "host/border/HostFailure.h"
 #include "host/border/NumberList.h"
+#include "host/track/Instant.h"
 #include "velmark/Attributes.h"
 
+#include <algorithm>
 #include <vector>
 
 using namespace Velmark;
@@ -18,8 +20,8 @@ void ProjectEnd::putOffTo(double end, bool isPreviewWritten)
     if (before && !isStillAt(before->to))
         return;
     const double present = root()->getEnd(nullptr);
-    const bool isSet = present > m_contentEnd();
-    if (end <= present || (!before && !isSet && isPreviewWritten))
+    const bool isSet = isBefore(m_contentEnd(), present);
+    if (!isBefore(present, end) || (!before && !isSet && isPreviewWritten))
         return;
     const double from = before ? before->from : isSet ? present : 0.0;
     // First, so that no end is put off that nobody knows to put back.
@@ -66,9 +68,8 @@ void ProjectEnd::forget() const
 
 bool ProjectEnd::isStillAt(double end) const
 {
-    const double present = root()->getEnd(nullptr);
     // What lies past it hides it.
-    return present == end || (present > end && present <= m_contentEnd());
+    return isWithin(root()->getEnd(nullptr), end, std::max(end, m_contentEnd()));
 }
 
 } // namespace cadrel::host

@@ -12,7 +12,9 @@
 #include "velmark/Editing.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <set>
+#include <string>
 #include <utility>
 
 using namespace Velmark;
@@ -156,15 +158,17 @@ std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRa
         events = record->others(std::move(events));
     findMarkerTracks();
     if (track == markerTrack(TrackRole::Memos)) {
-        // What the user has made of the copy of a memo is in the memo itself.
-        std::set<std::int64_t> ids;
+        // What the user has made of the copy of a memo is in the memo itself, unless the copy stands where the new cut has
+        // nothing. There it may have a name of its own.
+        std::set<std::pair<std::int64_t, std::wstring>> memos;
         for (const HostEvent& memo : track.clipEvents()) {
             if (isBefore(memo.getStart(), stretch.start + timeOrigin()))
-                ids.insert(memo.getUserId());
+                memos.emplace(memo.getUserId(), memo.getName());
         }
         std::erase_if(events, [&](const Node& event) {
-            const std::int64_t id = HostEvent(track, event).getUserId();
-            return id > 0 && ids.contains(id);
+            const HostEvent copy(track, event);
+            const std::int64_t id = copy.getUserId();
+            return id > 0 && memos.contains({id, copy.getName()});
         });
     }
     return events;

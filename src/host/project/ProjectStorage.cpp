@@ -92,6 +92,16 @@ bool isKept(IProjectNode& project, const Stored& stored)
            project.setAttribute(AttributeKey::StorageChecksum, stored.checksum, true) == ResultOk;
 }
 
+/// Puts what is stored aside, for the program of another version that wrote it. Throws Result::HostCallFailed when the host
+/// doesn't keep both.
+void keepAside(IProjectNode& project)
+{
+    if (const std::optional<Stored> stored = storedIn(project)) {
+        requireOk(project.setAttribute(AttributeKey::OtherStorage, stored->list, true));
+        requireOk(project.setAttribute(AttributeKey::OtherStorageChecksum, stored->checksum, true));
+    }
+}
+
 /// Throws Result::HostCallFailed when the host doesn't keep both.
 void replaceStored(IProjectNode& project, const Stored& stored)
 {
@@ -110,19 +120,19 @@ void replaceStored(IProjectNode& project, const Stored& stored)
 
 void Project::load()
 {
-    findLockedTracks();
     FirstFailure failure;
+    // First, so that a track that can't be handled doesn't let the next save replace what nobody has read.
     failure.ofStep([this] {
-        try {
-            readModel();
-        } catch (...) {
-            // The model has emptied itself, but for the VFX patterns that it has read.
+        const Result::Type result = resultOf([this] { readModel(); });
+        m_isOfOtherVersion = result == Result::NewerVersion || result == Result::UnknownVersion;
+        // The model has emptied itself, but for the VFX patterns that it has read.
+        if (result != Result::Ok)
             m_model.settings() = core::Settings();
-            throw;
-        }
+        requireSuccess(result);
     });
+    failure.ofStep([this] { findLockedTracks(); });
     if (m_model.isPreviewActive()) {
-        findPreviewedTracks();
+        failure.ofStep([this] { findPreviewedTracks(); });
     } else {
         // There is no preview that the user could switch off. If a track can't be unlocked here, the next run unlocks
         // it.
@@ -189,6 +199,9 @@ void Project::save()
     block << m_model;
     const auto list = required(create<IAttributeData>(m_hostContext));
     writeBlock(*list, AttributeKey::StorageData, block);
+    if (m_isOfOtherVersion)
+        keepAside(*project);
+    m_isOfOtherVersion = false;
     FirstFailure failure;
     failure.ofStep([&] { writePreviewEvents(*list); });
     failure.ofStep([&] { replaceStored(*project, {FVariant::object(list.get()), FVariant::integer(block.crc32())}); });

@@ -10,9 +10,8 @@
 #include "velmark/Context.h"
 #include "velmark/Editing.h"
 
-#include <algorithm>
 #include <cmath>
-#include <iterator>
+#include <utility>
 
 using namespace Velmark;
 
@@ -24,7 +23,7 @@ AutomationCurve::AutomationCurve(FUnknown* curve, double origin)
 {
     for (const Counted<IProjectNode>& point : childrenOf(*m_curve)) {
         const double value = required(query<IAutomationPoint>(point))->getValue();
-        m_points.push_back({point->getStart(m_curve.get()) + origin, value, point});
+        m_left.push_back({point->getStart(m_curve.get()) + origin, value, point});
     }
 }
 
@@ -33,19 +32,19 @@ core::AutomationState AutomationCurve::stateAt(double time) const
     core::AutomationState state;
     const std::size_t right = firstAfter(time);
     if (right > 0) {
-        const Point& left = m_points[right - 1];
+        const Point& left = at(right - 1);
         state = {left.time, left.value, time, left.value};
     }
-    if (right < m_points.size()) {
-        state.rightTime = m_points[right].time;
-        state.rightValue = m_points[right].value;
+    if (right < size()) {
+        state.rightTime = at(right).time;
+        state.rightValue = at(right).value;
     }
     return state;
 }
 
 void AutomationCurve::fill(IHostContext* context, IEditTransaction& transaction, double start, double end)
 {
-    if (end < start || m_points.empty())
+    if (end < start || isEmpty())
         return;
     replace(context, transaction, firstAt(start), firstAfter(end),
             {{start, valueBefore(start)}, {end, valueBehind(end)}});
@@ -59,35 +58,40 @@ void AutomationCurve::hold(IHostContext* context, IEditTransaction& transaction,
 void AutomationCurve::holdAsAt(double time, IHostContext* context, IEditTransaction& transaction, double start,
                                double end)
 {
-    if (!m_points.empty())
+    if (!isEmpty())
         level(context, transaction, start, end, valueBefore(time));
 }
 
 void AutomationCurve::holdBackwards(IHostContext* context, IEditTransaction& transaction, double start, double end)
 {
-    if (!m_points.empty())
+    if (!isEmpty())
         level(context, transaction, start, end, valueBehind(end));
 }
 
 void AutomationCurve::holdLast(IHostContext* context, IEditTransaction& transaction, double start, double end)
 {
-    if (m_points.empty() || firstAfter(end) < m_points.size()) {
+    if (isEmpty() || firstAfter(end) < size()) {
         hold(context, transaction, start, end);
         return;
     }
     const double value = valueBefore(start);
-    const bool isSteady = std::all_of(m_points.begin() + static_cast<std::ptrdiff_t>(firstAt(start)), m_points.end(),
-                                      [value](const Point& point) { return point.value == value; });
-    if (!isSteady)
-        replace(context, transaction, firstAt(start), m_points.size(), {{start, value}});
+    if (!haveValue(firstAt(start), size(), value))
+        replace(context, transaction, firstAt(start), size(), {{start, value}});
 }
 
 bool AutomationCurve::isLevel(double start, double end, double value) const
 {
-    const auto from = m_points.begin() + static_cast<std::ptrdiff_t>(firstAfter(start));
-    const auto to = m_points.begin() + static_cast<std::ptrdiff_t>(firstAt(end));
     return valueBehind(start) == value && valueBefore(end) == value &&
-           std::all_of(from, to, [value](const Point& point) { return point.value == value; });
+           haveValue(firstAfter(start), firstAt(end), value);
+}
+
+bool AutomationCurve::haveValue(std::size_t first, std::size_t last, double value) const
+{
+    for (std::size_t index = first; index < last; ++index) {
+        if (at(index).value != value)
+            return false;
+    }
+    return true;
 }
 
 void AutomationCurve::level(IHostContext* context, IEditTransaction& transaction, double start, double end,
@@ -108,51 +112,74 @@ void AutomationCurve::level(IHostContext* context, IEditTransaction& transaction
 void AutomationCurve::replace(IHostContext* context, IEditTransaction& transaction, std::size_t first, std::size_t last,
                               const std::vector<Place>& places)
 {
-    const auto from = m_points.begin() + static_cast<std::ptrdiff_t>(first);
-    const auto to = m_points.begin() + static_cast<std::ptrdiff_t>(last);
-    for (auto point = from; point != to; ++point)
-        requireOk(transaction.remove(m_curve.get(), point->node.get()));
-    std::vector<Point> inserted;
+    partAt(first);
+    for (std::size_t index = first; index < last; ++index) {
+        requireOk(transaction.remove(m_curve.get(), m_right.back().node.get()));
+        m_right.pop_back();
+    }
     for (const Place& place : places)
-        inserted.push_back(insertPoint(context, transaction, place.time, place.value));
-    m_points.insert(m_points.erase(from, to), inserted.begin(), inserted.end());
+        m_left.push_back(insertPoint(context, transaction, place.time, place.value));
+}
+
+void AutomationCurve::partAt(std::size_t index)
+{
+    while (m_left.size() > index) {
+        m_right.push_back(std::move(m_left.back()));
+        m_left.pop_back();
+    }
+    while (m_left.size() < index) {
+        m_left.push_back(std::move(m_right.back()));
+        m_right.pop_back();
+    }
+}
+
+template <typename IsTrue>
+std::size_t AutomationCurve::firstWithout(const IsTrue& isTrue) const
+{
+    std::size_t first = 0;
+    for (std::size_t count = size(); count > 0;) {
+        const std::size_t half = count / 2;
+        if (isTrue(at(first + half))) {
+            first += half + 1;
+            count -= half + 1;
+        } else {
+            count = half;
+        }
+    }
+    return first;
 }
 
 std::size_t AutomationCurve::firstAt(double time) const
 {
-    const auto found =
-        std::ranges::partition_point(m_points, [time](const Point& point) { return isBefore(point.time, time); });
-    return static_cast<std::size_t>(found - m_points.begin());
+    return firstWithout([time](const Point& point) { return isBefore(point.time, time); });
 }
 
 std::size_t AutomationCurve::firstAfter(double time) const
 {
-    const auto found =
-        std::ranges::partition_point(m_points, [time](const Point& point) { return !isBefore(time, point.time); });
-    return static_cast<std::size_t>(found - m_points.begin());
+    return firstWithout([time](const Point& point) { return !isBefore(time, point.time); });
 }
 
 double AutomationCurve::valueBetween(std::size_t index, double time) const
 {
     if (index == 0)
-        return m_points.front().value;
-    const Point& left = m_points[index - 1];
-    if (index == m_points.size())
+        return at(0).value;
+    const Point& left = at(index - 1);
+    if (index == size())
         return left.value;
-    const Point& right = m_points[index];
+    const Point& right = at(index);
     return std::lerp(left.value, right.value, (time - left.time) / (right.time - left.time));
 }
 
 double AutomationCurve::valueBefore(double time) const
 {
     const std::size_t index = firstAt(time);
-    return index < firstAfter(time) ? m_points[index].value : valueBetween(index, time);
+    return index < firstAfter(time) ? at(index).value : valueBetween(index, time);
 }
 
 double AutomationCurve::valueBehind(double time) const
 {
     const std::size_t index = firstAfter(time);
-    return index > firstAt(time) ? m_points[index - 1].value : valueBetween(index, time);
+    return index > firstAt(time) ? at(index - 1).value : valueBetween(index, time);
 }
 
 AutomationCurve::Point AutomationCurve::insertPoint(IHostContext* context, IEditTransaction& transaction, double time,

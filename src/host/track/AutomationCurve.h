@@ -71,6 +71,19 @@ private:
         double value;
     };
 
+    std::size_t size() const { return m_left.size() + m_right.size(); }
+    bool isEmpty() const { return size() == 0; }
+    const Point& at(std::size_t index) const
+    {
+        return index < m_left.size() ? m_left[index] : m_right[size() - 1 - index];
+    }
+    /// Parts the points before that at `index`.
+    void partAt(std::size_t index);
+    /// Whether the points from `first` up to `last`, by index, have that value.
+    bool haveValue(std::size_t first, std::size_t last, double value) const;
+    /// The first point of which something isn't true that is true of all before it, by index.
+    template <typename IsTrue>
+    std::size_t firstWithout(const IsTrue& isTrue) const;
     /// The first point that doesn't stand before the time, and the first that stands after it, by index.
     std::size_t firstAt(double time) const;
     std::size_t firstAfter(double time) const;
@@ -92,7 +105,9 @@ private:
     Velmark::Counted<Velmark::IProjectNode> m_curve;
     double m_origin;
     std::int32_t m_number;
-    std::vector<Point> m_points; ///< in the order of the curve
+    // The points in the order of the curve, parted where it was changed last, so that changes one after the other move few.
+    std::vector<Point> m_left;
+    std::vector<Point> m_right; ///< the next one is the last
 };
 
 } // namespace cadrel::host

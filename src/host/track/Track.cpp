@@ -35,24 +35,6 @@ constexpr double HalfFrame = 0.02;
 /// The kinds of tracks whose events eventAt and clipEvents know.
 constexpr std::array EventKinds{TypeWord::Audio, TypeWord::Marker, TypeWord::Video};
 
-/// Whether `part` is the larger part of an event and `rest` the smaller one, by more than the rounding of times.
-bool isMostOf(double part, double rest)
-{
-    return isBefore(rest, part);
-}
-
-///     range                      |------------|
-///     counts                   |-----|     |-----|
-///     doesn't count         |-----|          |-----|
-///     counts             |------------------------|
-///     doesn't count             |------------------------------|
-bool countsAsIn(const core::SecondsRange& event, double start, double end)
-{
-    if (isWithin(event.end, start, end))
-        return isWithin(event.start, start, end) || isMostOf(event.end - start, start - event.start);
-    return isBefore(end, event.end) && isMostOf(end - event.start, event.end - end);
-}
-
 /// Where an event stands, in seconds from the time origin. One in a part ends with the outermost part around it.
 core::SecondsRange spanOf(IProjectNode& event, FUnknown* times)
 {
@@ -250,7 +232,7 @@ std::vector<HostEvent> Track::eventsInRange(double start, double end) const
         throw Result::InvalidArgument;
     const auto times = container();
     for (Counted<IProjectNode>& child : childrenOf(*node)) {
-        if (countsAsIn({child->getStart(times.get()), child->getEnd(times.get())}, start, end))
+        if (countsAsIn({child->getStart(times.get()), child->getEnd(times.get())}, {start, end}))
             events.emplace_back(*this, std::move(child));
     }
     return events;

@@ -13,6 +13,12 @@
 
 namespace cadrel::host {
 
+/// The edit of a change that is an entry of the undo list by itself; as long as the change.
+struct NamedEdit {
+    Velmark::IEditTransaction* transaction;
+    Velmark::IProjectDocument* project;
+};
+
 /// Brings one change of the model into the host's undo list: it takes a snapshot of the state before the change when it
 /// is created, and gives it to the transaction when it is destroyed. It ignores a failure of the host there, because a
 /// destructor must not throw.
@@ -20,23 +26,18 @@ class DataModelChangeCommand : public core::DataModelChangeCommand {
 public:
     /// A change that is an entry of the undo list by itself: begins the transaction, and commits it under the name at the
     /// end. Throws Result::HostCallFailed when it can't begin; nothing is committed then.
-    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction,
-                           const std::shared_ptr<core::DataModel>& model, Velmark::IProjectDocument* project);
+    DataModelChangeCommand(std::wstring name, std::shared_ptr<const NamedEdit> edit,
+                           const std::shared_ptr<core::DataModel>& model);
     /// A change within an open transaction, whose commit is somebody else's. `before` is the snapshot to go back to.
     DataModelChangeCommand(Velmark::IEditTransaction& transaction, const std::shared_ptr<core::DataModel>& model,
                            Velmark::IProjectDocument* project, core::serialize::ByteArchive before);
     ~DataModelChangeCommand() override;
 
 private:
-    /// The other constructors call this one.
-    DataModelChangeCommand(std::wstring name, Velmark::IEditTransaction& transaction,
-                           const std::shared_ptr<core::DataModel>& model, Velmark::IProjectDocument* project,
-                           core::serialize::ByteArchive before, bool commitOnEnd);
-
     Velmark::Counted<Velmark::IEditTransaction> m_transaction;
     Velmark::Counted<Velmark::IProjectDocument> m_project;
     Velmark::Counted<DataModelEditStep> m_step;
-    bool m_commitOnEnd;
+    std::shared_ptr<const NamedEdit> m_namedEdit; ///< null for a change within an open transaction
 };
 
 } // namespace cadrel::host

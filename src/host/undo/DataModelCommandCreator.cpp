@@ -20,7 +20,10 @@ Command DataModelCommandCreator::createCommand(const std::wstring& name)
         return nullptr;
     const auto editService = required(Velmark::service<Velmark::IEditService>(serviceContext()));
     const auto transaction = required(Velmark::query<Velmark::IEditTransaction>(editService));
-    return std::make_unique<DataModelChangeCommand>(name, *transaction, document->model, document->project);
+    const auto edit = std::make_shared<NamedEdit>(NamedEdit{transaction.get(), document->project});
+    auto command = std::make_unique<DataModelChangeCommand>(name, edit, document->model);
+    m_namedEdit = edit;
+    return command;
 }
 
 Command DataModelCommandCreator::createCommand(EditTransactionHandle& transaction)
@@ -36,6 +39,12 @@ Command DataModelCommandCreator::createCommand(EditTransactionHandle& transactio
         return nullptr;
     return std::make_unique<DataModelChangeCommand>(transaction.transaction(), document->model, document->project,
                                                     snapshot);
+}
+
+Velmark::IEditTransaction* DataModelCommandCreator::namedEdit(const Velmark::IProjectDocument* project) const
+{
+    const std::shared_ptr<const NamedEdit> edit = m_namedEdit.lock();
+    return edit && edit->project == project ? edit->transaction : nullptr;
 }
 
 } // namespace cadrel::host

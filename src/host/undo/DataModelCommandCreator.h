@@ -32,6 +32,8 @@ private:
 
 namespace cadrel::host {
 
+struct NamedEdit;
+
 /// Makes the undo scopes for the model of the active project. Without an active project there are none, and the change is
 /// made without undo.
 class DataModelCommandCreator : public core::DataModelCommandCreator {
@@ -55,6 +57,12 @@ protected:
     virtual std::optional<Document> activeDocument() = 0;
     /// Where the edit service is asked for.
     virtual Velmark::IHostContext* serviceContext() = 0;
+
+    /// The edit of a command with a name that goes on now; null without one. It is for that project alone.
+    Velmark::IEditTransaction* namedEdit(const Velmark::IProjectDocument* project) const;
+
+private:
+    std::weak_ptr<const NamedEdit> m_namedEdit;
 };
 
 } // namespace cadrel::host

@@ -21,6 +21,7 @@ public:
     bool hasContainers = true;
     Velmark::IMarkerTrack* defaultMarkerTrack = nullptr;
     Velmark::int32 endResult = Velmark::ResultOk;
+    double endRounding = 0.0; ///< how much later the end comes to stand than it was set, in seconds
 
     Velmark::int32 queryInterface(const Velmark::Identifier& id, void** out) override
     {
@@ -30,7 +31,7 @@ public:
 
     Velmark::int32 setProjectEnd(double seconds) override
     {
-        return endResult == Velmark::ResultOk ? m_document->setProjectEnd(seconds) : endResult;
+        return endResult == Velmark::ResultOk ? m_document->setProjectEnd(seconds + endRounding) : endResult;
     }
     Velmark::IFilePath* getProjectFile(Velmark::IProjectDocument* project) override
     {

@@ -5,6 +5,7 @@
 #include "core/cut/Cut.h"
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/EventMaking.h"
 #include "tests/support/core/TestProject.h"
@@ -30,6 +31,7 @@
 
 using namespace Velmark;
 using cadrel::tests::makeEvent;
+using cadrel::tests::secondsOf;
 using cadrel::tests::thrownBy;
 using cadrel::util::Result;
 using standin::tests::Chance;
@@ -826,6 +828,38 @@ TEST_P(MemoSyncTest, ARefusalIsAFailure)
     addCopy(u"splash", 35.0);
     EXPECT_EQ(followed, Result::HostCallFailed);
     EXPECT_EQ(film(), Content{"cue 12"});
+}
+
+TEST(MemoSync, IsNotQuadraticInThePreviewedEvents)
+{
+    const auto secondsToFollow = [](int eventCount, bool hasMemos) {
+        PreviewedMemos previewed(0.0);
+        for (int second = 0; hasMemos && second < 20; ++second)
+            previewed.addMemo(u"cue", second);
+        const core::Timecode begin(1, 0, 0, 0);
+        for (int frame = 0; frame < eventCount; ++frame) {
+            auto event = std::make_shared<core::EventBase>();
+            const core::Timecode in(begin.toFrameCount() + frame);
+            const core::Timecode out(begin.toFrameCount() + frame + 1);
+            event->setTimecodes(in, out, in, out);
+            previewed.host.adapter.previewEvents().add(std::move(event));
+        }
+        previewed.host.adapter.model().setPreviewActive(true);
+        return secondsOf([&] {
+            previewed.host.adapter.onProjectChanged();
+            for (int second = 0; second < 5; ++second)
+                previewed.addCopy(u"note", second + 0.5);
+        });
+    };
+    secondsToFollow(1000, true);
+
+    for (const bool hasMemos : {false, true}) {
+        SCOPED_TRACE(hasMemos);
+        const double few = std::max(secondsToFollow(5000, hasMemos), secondsToFollow(5000, hasMemos));
+        const double many = std::min(secondsToFollow(20000, hasMemos), secondsToFollow(20000, hasMemos));
+
+        EXPECT_LT(many, 8.0 * few);
+    }
 }
 
 /// Memos and previewed events in tens of seconds, at random; the events share neither sources nor destinations. The user

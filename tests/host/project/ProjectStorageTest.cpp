@@ -89,6 +89,27 @@ struct UnreliableProject : FakeProject {
     int32 removeAttribute(const char* key) override { return kept.erase(key) == 1 ? ResultOk : ResultFalse; }
 };
 
+/// A project with a track that isn't to be had as one. What is stored is that of another.
+class UnusableTrackBesideStorage : public FakeProject {
+public:
+    explicit UnusableTrackBesideStorage(IProjectNode& stored) : FakeProject(0.0), m_stored(&stored)
+    {
+        children = withoutUsableTrack()->children;
+        isTrack = false;
+    }
+
+    int32 setAttribute(const char* key, const FVariant& value, bool flag) override
+    {
+        return m_stored->setAttribute(key, value, flag);
+    }
+    int32 getAttribute(const char* key, FVariant& value) override { return m_stored->getAttribute(key, value); }
+    int32 hasAttribute(const char* key) override { return m_stored->hasAttribute(key); }
+    int32 removeAttribute(const char* key) override { return m_stored->removeAttribute(key); }
+
+private:
+    IProjectNode* m_stored;
+};
+
 class ProjectStorageTest : public testing::Test {
 protected:
     void SetUp() override
@@ -250,6 +271,42 @@ TEST_F(ProjectStorageTest, ANewerVersionIsRefused)
     store(bytesOf("02 00 00 00"));
 
     EXPECT_EQ(loadFailure(), Result::NewerVersion);
+}
+
+TEST_F(ProjectStorageTest, TheFirstSaveAfterANewerVersionPutsThatAside)
+{
+    const Bytes newer = bytesOf("02 00 00 00");
+    store(newer);
+    const std::int64_t checksum = stored(AttributeKey::StorageChecksum).asInteger();
+    Project opened(host.context(), host.document());
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::NewerVersion);
+    EXPECT_EQ(host.root()->hasAttribute(AttributeKey::OtherStorage), ResultFalse);
+
+    opened.save();
+    const auto list = query<IAttributeData>(stored(AttributeKey::OtherStorage).asObject());
+    ASSERT_TRUE(list);
+    Bytes kept(static_cast<std::size_t>(list->getBinarySize(AttributeKey::StorageData)));
+    ASSERT_EQ(list->getBinary(AttributeKey::StorageData, kept.data(), static_cast<int32>(kept.size())), ResultOk);
+    EXPECT_EQ(kept, newer);
+    EXPECT_EQ(stored(AttributeKey::OtherStorageChecksum).asInteger(), checksum);
+    EXPECT_EQ(storedBlock(), contentOf(opened.model()));
+
+    // What was put aside isn't replaced by what this program has written.
+    opened.model().newEdl().add(makeEvent("B", "00:10:00:00", "00:10:10:00", "01:00:00:00", "01:00:10:00", 1));
+    opened.save();
+    EXPECT_EQ(stored(AttributeKey::OtherStorageChecksum).asInteger(), checksum);
+}
+
+TEST_F(ProjectStorageTest, ASaveAfterAnyOtherFailurePutsNothingAside)
+{
+    store(contentOf(host.adapter.model()), 0);
+    Project opened(host.context(), host.document());
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::ChecksumMismatch);
+
+    opened.save();
+
+    EXPECT_EQ(host.root()->hasAttribute(AttributeKey::OtherStorage), ResultFalse);
+    EXPECT_EQ(host.root()->hasAttribute(AttributeKey::OtherStorageChecksum), ResultFalse);
 }
 
 TEST_F(ProjectStorageTest, ANewerVersionWithinIsRefused)
@@ -512,6 +569,20 @@ TEST_F(ProjectStorageTest, UnlocksWhatItHeldForAPreviewThatIsGone)
     store(block, archiveOf(block).crc32() ^ 1U);
     EXPECT_EQ(loadFailure(), Result::ChecksumMismatch);
     expectUnlocked();
+}
+
+TEST_F(ProjectStorageTest, KeepsWhatIsStoredWhereTheTracksCannotBeRead)
+{
+    host.adapter.save();
+    const Bytes before = storedBlock();
+    const auto project = makeCounted<UnusableTrackBesideStorage>(*host.root());
+    Project opened(host.context(), project.get());
+
+    EXPECT_EQ(thrownBy([&] { opened.load(); }), Result::HostObjectMissing);
+    EXPECT_EQ(contentOf(opened.model()), contentOf(host.adapter.model()));
+    opened.save();
+
+    EXPECT_EQ(storedBlock(), before);
 }
 
 TEST_F(ProjectStorageTest, GivesAnEmptyModelWhereTheTracksCannotBeRead)

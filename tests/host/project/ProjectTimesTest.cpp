@@ -372,6 +372,27 @@ TEST_P(ProjectTimesTest, TheProjectEndStaysWithoutPreview)
     EXPECT_EQ(host.adapter.projectEnd(), host.origin);
 }
 
+TEST_P(ProjectTimesTest, TheProjectEndGoesBackAlsoWhereTheHostRoundsIt)
+{
+    // An instant is 2.6 microseconds.
+    for (const double rounding : {-2e-6, -1e-9, 1e-9, 2e-6}) {
+        SCOPED_TRACE(rounding);
+        requireOk(host.document()->setProjectEnd(5000.0 - host.origin));
+        AlteredDocument document(host.document());
+        document.endRounding = rounding;
+        Project rounded(host.context(), &document);
+        rounded.model().setPreviewActive(true);
+        rounded.computePreviewOffset();
+        rounded.extendProjectEnd(false);
+        ASSERT_NEAR(rounded.projectEnd(), 2.0 * Day, 1e-5);
+
+        rounded.model().setPreviewActive(false);
+        rounded.extendProjectEnd(false);
+
+        EXPECT_NEAR(rounded.projectEnd(), 5000.0, 1e-5);
+    }
+}
+
 TEST_P(ProjectTimesTest, TheProjectEndGoesBackWhenThePreviewIsOver)
 {
     requireOk(host.document()->setProjectEnd(5000.0 - host.origin));

@@ -4,6 +4,7 @@
 
 #include "host/border/HostFailure.h"
 #include "host/track/TrackIndex.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/host/AlteredContext.h"
 #include "tests/support/host/FakeProject.h"
 #include "tests/support/host/TrackHost.h"
@@ -23,6 +24,7 @@ using namespace Velmark;
 
 namespace cadrel::host {
 
+using cadrel::tests::secondsOf;
 using core::AutomationState;
 using tests::AlteredContext;
 using tests::FakeNode;
@@ -495,6 +497,31 @@ private:
 
     std::vector<std::pair<double, double>> m_before;
 };
+
+TEST(AutomationCurve, HoldingManyStretchesOneAfterTheOtherIsNotQuadratic)
+{
+    const auto secondsToHold = [](int count) {
+        OneTrack host(0.0);
+        host.edit(u"Points", [&] {
+            for (int index = 0; index < count; ++index)
+                host.addPoint(host.node, Volume, index, index % 2 == 0 ? 0.25F : 0.75F);
+        });
+        double seconds = 0.0;
+        host.change(Volume, [&](AutomationCurve& curve) {
+            seconds = secondsOf([&] {
+                for (int index = 0; index + 1 < count; ++index)
+                    curve.hold(host.context(), *host.transaction(), index + 0.25, index + 0.75);
+            });
+        });
+        return seconds;
+    };
+    secondsToHold(1000);
+
+    const double few = std::max(secondsToHold(5000), secondsToHold(5000));
+    const double many = std::min(secondsToHold(20000), secondsToHold(20000));
+
+    EXPECT_LT(many, 8.0 * few);
+}
 
 RC_GTEST_PROP(AutomationCurveLaw, FillingAGapChangesNothingOutsideOfItAndIsStraightInside, ())
 {

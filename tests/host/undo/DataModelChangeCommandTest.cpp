@@ -21,7 +21,13 @@ using util::Result;
 
 using Names = std::vector<std::u16string>;
 
-using DataModelChangeCommandTest = HostedModel;
+class DataModelChangeCommandTest : public HostedModel {
+protected:
+    std::shared_ptr<const NamedEdit> edit(IEditTransaction& transaction)
+    {
+        return std::make_shared<NamedEdit>(NamedEdit{&transaction, host.document()});
+    }
+};
 
 /// A transaction that writes down what it is told, keeps the step, and answers what the test wants.
 class RecordingTransaction : public Implements<RecordingTransaction, FObject, IEditTransaction> {
@@ -68,7 +74,7 @@ TEST_F(DataModelChangeCommandTest, MakesANamedChangeOneEntryOfTheUndoList)
     const Bytes before = bytes();
 
     {
-        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), shared, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", edit(*host.transaction()), shared);
         EXPECT_TRUE(isEditOpen());
         change("B");
         EXPECT_EQ(undoNames(), Names{});
@@ -88,7 +94,7 @@ TEST_F(DataModelChangeCommandTest, MakesAnEntryWithoutAChangeToo)
     const Bytes before = bytes();
 
     {
-        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), shared, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", edit(*host.transaction()), shared);
     }
 
     EXPECT_EQ(undoNames(), Names{u"Load New EDL"});
@@ -142,7 +148,7 @@ TEST_F(DataModelChangeCommandTest, KeepsWhatWasChangedBeforeAFailureAsItsEntry)
 {
     const Bytes before = bytes();
     const auto failingChange = [&] {
-        const DataModelChangeCommand command(L"Load New EDL", *host.transaction(), shared, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", edit(*host.transaction()), shared);
         change("B");
         throw Result::OutOfRange;
     };
@@ -160,7 +166,7 @@ TEST_F(DataModelChangeCommandTest, LeavesAnEditAloneThatIsOpenAlready)
 {
     host.transaction()->begin(true);
 
-    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", *host.transaction(), shared, host.document()); }),
+    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", edit(*host.transaction()), shared); }),
               Result::HostCallFailed);
 
     EXPECT_TRUE(isEditOpen());
@@ -172,7 +178,7 @@ TEST_F(DataModelChangeCommandTest, IsntMadeOfAModelThatCantBeStored)
 {
     model.changeEdl().add(std::make_shared<UnwritableEvent>());
 
-    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", *host.transaction(), shared, host.document()); }),
+    EXPECT_EQ(thrownBy([&] { DataModelChangeCommand(L"Load New EDL", edit(*host.transaction()), shared); }),
               Result::OutOfRange);
 
     EXPECT_FALSE(isEditOpen());
@@ -184,7 +190,7 @@ TEST_F(DataModelChangeCommandTest, AddsItsStepAndCommitsUnderTheNameInUtf16)
     const auto transaction = makeCounted<RecordingTransaction>();
 
     {
-        const DataModelChangeCommand command(L"Z\u00fcrich \U0001F3AC", *transaction, shared, host.document());
+        const DataModelChangeCommand command(L"Z\u00fcrich \U0001F3AC", edit(*transaction), shared);
         EXPECT_EQ(transaction->calls, std::vector<std::string>{"begin true"});
         EXPECT_EQ(transaction->refCount(), 2);
     }
@@ -202,7 +208,7 @@ TEST_F(DataModelChangeCommandTest, HoldsTheProjectForWhichItCommits)
     const auto before = host.project.refCount();
 
     {
-        const DataModelChangeCommand command(L"Load New EDL", *transaction, shared, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", edit(*transaction), shared);
         EXPECT_EQ(host.project.refCount(), before + 1);
     }
 
@@ -227,7 +233,7 @@ TEST_F(DataModelChangeCommandTest, PassesOverWhatTheHostRefusesAtTheEnd)
     const auto transaction = makeCounted<RecordingTransaction>();
 
     {
-        const DataModelChangeCommand command(L"Load New EDL", *transaction, shared, host.document());
+        const DataModelChangeCommand command(L"Load New EDL", edit(*transaction), shared);
         transaction->answer = ResultFalse;
     }
 
@@ -243,7 +249,7 @@ RC_GTEST_FIXTURE_PROP(DataModelChangeCommandTest, TheUndoListLeadsToEveryStateOf
     for (const bool ofModelAlone : edits) {
         const std::string roll = std::string("R").append(std::to_string(states.size()));
         if (ofModelAlone) {
-            const DataModelChangeCommand command(L"Edit", *host.transaction(), shared, host.document());
+            const DataModelChangeCommand command(L"Edit", edit(*host.transaction()), shared);
             change(roll);
         } else {
             host.edit(u"Run", [&] {

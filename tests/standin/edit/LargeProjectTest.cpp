@@ -5,6 +5,7 @@
 #include "tests/support/standin/TestHost.h"
 
 #include "standin/project/Track.h"
+#include "tests/support/SecondsOf.h"
 #include "velmark/Events.h"
 #include "velmark/Media.h"
 #include "velmark/Tracks.h"
@@ -12,22 +13,14 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <ctime>
 #include <functional>
 
 using namespace Velmark;
+using cadrel::tests::secondsOf;
 
 namespace standin::tests {
 
 namespace {
-
-/// Of the processor, so that other programs don't count.
-double secondsOf(const std::function<void()>& work)
-{
-    const std::clock_t begun = std::clock();
-    work();
-    return static_cast<double>(std::clock() - begun) / CLOCKS_PER_SEC;
-}
 
 /// One track with so many clips of a second, which come in no order, and an envelope with as many points.
 class LargeHost : public TestHost {
