@@ -138,8 +138,15 @@ void addOutput(CLI::App& command, const char* name, std::string& file, const cha
 void addResult(CLI::App& command, std::string& file, Replacing& replacing, const char* help)
 {
     addOutput(command, "-o,--output", file, help);
-    command.add_flag("--overwrite", replacing.isAllowed, "Replace the file of -o where it exists");
+    command.add_flag("--overwrite", replacing.isAllowed, "Replace files that exist");
     command.add_flag("--backup", replacing.keepsFormer, "Keep what is replaced, as NAME_backup_1 and so on");
+}
+
+/// JSON beside what the command prints.
+void addJson(CLI::App& command, std::string& file, bool& isReplacing, const char* help)
+{
+    addOutput(command, "--json", file, help);
+    command.add_flag("--overwrite", isReplacing, "Replace the file of --json where it exists");
 }
 
 CLI::Option* addFiles(CLI::App& command, const char* name, std::vector<std::string>& files, const char* help)
@@ -403,7 +410,7 @@ CLI::App* addList(CLI::App& program, ListOptions& options)
     list->add_option("FILE", options.files, "EDLs to show")->type_name("")->required();
     list->add_flag("--audio", options.load.acceptAudio, "Accept audio events, as for a change EDL");
     list->add_flag("--summary", options.summary, "Print the totals alone");
-    addOutput(*list, "--json", options.jsonFile, EventsJsonHelp);
+    addJson(*list, options.jsonFile, options.isReplacing, EventsJsonHelp);
     addShift(*list, options.shifts);
     addLoadOptions(*list, options.load);
     list->footer(ListHelp);
@@ -418,7 +425,7 @@ CLI::App* addShow(CLI::App& program, ShowOptions& options)
                      "Show only the tracks of that name; a folder stands for all that is in it")
         ->check(isNamed)
         ->type_name("NAME");
-    addOutput(*show, "--json", options.jsonFile, AllJsonHelp);
+    addJson(*show, options.jsonFile, options.isReplacing, AllJsonHelp);
     show->footer(ShowHelp);
     return show;
 }

@@ -77,8 +77,10 @@ void checkOutputs(const ApplyOptions& options)
         taken.push_back(options.outputFile);
     }
     taken.push_back(options.projectFile);
-    if (Output::isFile(options.jsonFile))
+    if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite(taken, options.jsonFile);
+        requireReplaceable({options.jsonFile}, options.replacing);
+    }
 }
 
 HostedProject::Opening openingOf(const ApplyOptions& options)
@@ -437,8 +439,13 @@ void writeReport(Output& output, const core::DataModel& model, const ApplyJson& 
 void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, const ApplyOptions& options)
 {
     const std::string& target = targetOf(options);
-    Backups backups(options.replacing.keepsFormer ? std::vector{target} : std::vector<std::string>());
-    facts.backups = backups.names();
+    const auto namesToKeep = [&](const std::string& file) {
+        return options.replacing.keepsFormer ? std::vector{file} : std::vector<std::string>();
+    };
+    Backups formerProject(namesToKeep(target));
+    Backups formerReport(namesToKeep(options.jsonFile));
+    facts.projectBackups = formerProject.names();
+    facts.reportBackups = formerReport.names();
     std::optional<Output> report;
     if (Output::isFile(options.jsonFile)) {
         report.emplace(options.jsonFile);
@@ -452,9 +459,10 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
         hosted.saveOver(target);
     else if (!target.empty())
         hosted.saveAs(target);
-    backups.keep();
+    formerProject.keep();
     if (report)
         report->place();
+    formerReport.keep();
 }
 
 void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyOptions& options)

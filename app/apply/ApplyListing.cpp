@@ -219,8 +219,10 @@ void ApplyListing::printWritten(std::ostream& out) const
     if (m_facts.written.empty())
         written.emplace_back("no project; give -o PROJECT.stage or --in-place");
     out << "Written     " << joined(written) << '\n';
-    for (const std::string& backup : m_facts.backups)
-        out << "Backup      " << toPrintable(backup).text << '\n';
+    for (const auto* const backups : {&m_facts.projectBackups, &m_facts.reportBackups}) {
+        for (const std::string& backup : *backups)
+            out << "Backup      " << toPrintable(backup).text << '\n';
+    }
 }
 
 void ApplyListing::printTrackTotals(std::ostream& out) const

@@ -40,12 +40,14 @@ namespace fs = std::filesystem;
 
 namespace {
 
-/// Throws UsageError when one of the change EDL's files, or the JSON file, would overwrite another file of this run.
+/// Throws UsageError when one of the change EDL's files, or the JSON file, would overwrite another file of this run, and
+/// Failure when the JSON file would overwrite one that the user hasn't given up.
 void checkOutputs(const GenerateOptions& options, const std::vector<std::string>& changeFiles)
 {
     std::vector<std::string> taken = inputsOf(options.generation);
     if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite(taken, options.jsonFile);
+        requireReplaceable({options.jsonFile}, options.replacing);
         taken.push_back(options.jsonFile);
     }
     for (const std::string& file : changeFiles)
@@ -166,7 +168,10 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     std::optional<Interruption> interruption;
     if (!files.change.empty() || Output::isFile(options.jsonFile))
         interruption.emplace();
-    Backups backups(options.replacing.keepsFormer ? files.change : std::vector<std::string>());
+    std::vector<std::string> written = files.change;
+    if (Output::isFile(options.jsonFile))
+        written.push_back(options.jsonFile);
+    Backups backups(options.replacing.keepsFormer ? written : std::vector<std::string>());
     files.backups = backups.names();
     std::vector<std::string> used = inputsOf(options.generation);
     used.insert(used.end(), files.change.begin(), files.change.end());

@@ -400,7 +400,7 @@ TEST(Apply, TheProjectStaysBesideAnOutput)
     EXPECT_TRUE(tells(scene.apply({"--json", document}).out,
                       "Written     " + document.string() + ", no project; give -o PROJECT.stage or --in-place\n"));
 
-    const Outcome outcome = scene.apply({"-o", result, "--json", document, "--summary"});
+    const Outcome outcome = scene.apply({"-o", result, "--json", document, "--overwrite", "--summary"});
 
     EXPECT_EQ(contentOf(scene.project), before);
     EXPECT_EQ(json::parse(contentOf(document)).at("written"), result.string());
@@ -1210,11 +1210,13 @@ TEST(Apply, AFailureLeavesTheFilesAsTheyWere)
     };
     const std::string lost = scene.folder / "none/result.stage";
 
-    fail({"-o", lost, "--json", document}, lost + ": the folder does not exist; make it or give another");
-    fail({"-o", "/dev/full", "--json", document}, "/dev/full: can't be written; see whether the disk is full");
+    fail({"-o", lost, "--overwrite", "--json", document},
+         lost + ": the folder does not exist; make it or give another");
+    fail({"-o", "/dev/full", "--overwrite", "--json", document},
+         "/dev/full: can't be written; see whether the disk is full");
     fail({"--in-place", "--json", "/dev/full"}, "/dev/full: can't be written; see whether the disk is full");
     writeFile(scene.newFile, "");
-    fail({"--in-place", "--json", document}, scene.newFile + ": holds no events; give a CMX EDL");
+    fail({"--in-place", "--overwrite", "--json", document}, scene.newFile + ": holds no events; give a CMX EDL");
 
     EXPECT_EQ(contentOf(scene.project), before);
     EXPECT_EQ(contentOf(document), "former report");
@@ -1326,8 +1328,8 @@ TEST(Apply, AnInterruptionTakesTheRunBackAndLeavesTheFilesAsTheyWere)
     const std::string before = contentOf(scene.project);
     const std::string document = scene.folder.write("report.json", "former report");
 
-    const Outcome outcome =
-        runCadrelInterruptedAt("Processing Project", scene.arguments({"--in-place", "--json", document}));
+    const Outcome outcome = runCadrelInterruptedAt("Processing Project",
+                                                   scene.arguments({"--in-place", "--overwrite", "--json", document}));
 
     EXPECT_EQ(outcome.status, -1);
     EXPECT_FALSE(tells(outcome.out, "Applied")) << outcome.out;
