@@ -22,6 +22,7 @@
 #include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
+#include "core/keep/Material.h"
 #include "core/keep/PastRuns.h"
 #include "core/model/DataModel.h"
 #include "core/time/SecondsRange.h"
@@ -306,22 +307,47 @@ FrameRanges sourcesOf(const DataModel& model, const KeptRun* kept)
     return sources;
 }
 
-/// The runs that the project has behind it; the lists of the model tell of the last.
-core::PastRuns pastRunsOf(const DataModel& model)
+/// The frames of the new programme that a run with these settings may change.
+core::FrameRange allowedFrames(const Settings& settings)
+{
+    if (!settings.restrictRange())
+        return core::PastRuns::AllTime;
+    const FrameRanges frames = core::framesOfMaterial(
+        {{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()}}, Timecode::framerate());
+    return frames.empty() ? core::FrameRange() : frames.front();
+}
+
+/// The runs that the project has behind it; the lists of the model tell of the last, which could change `allowed`.
+core::PastRuns pastRunsOf(const DataModel& model, const core::FrameRange& allowed)
 {
     const Settings& settings = model.settings();
     core::PastRuns runs({settings.matchBy(), settings.vfxPatterns(), Timecode::framerate()});
     core::Variant stored;
     if (model.getProperty(core::PropertyKey::EarlierRuns, stored) == util::Result::Ok)
         runs.read(stored.toText());
-    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl());
+    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl(), allowed);
     return runs;
+}
+
+/// Where the run of the model's change list finds or leaves sound: what it may change, and where that comes from.
+FrameRanges readFrames(const DataModel& model)
+{
+    const core::FrameRange allowed = allowedFrames(model.settings());
+    FrameRanges frames{allowed};
+    if (allowed == core::PastRuns::AllTime)
+        return frames;
+    for (const auto& event : model.changeEdl().events()) {
+        const auto stretch = core::changeStretchOf(*event, Timecode::framerate());
+        if (stretch)
+            frames.push_back(intersect(stretch->destination, allowed).shiftedBy(-stretch->shift));
+    }
+    return core::united(std::move(frames));
 }
 
 /// Lets the project keep of the runs behind it what that of the model's lists leaves.
 void remember(core::PastRuns& runs, DataModel& model)
 {
-    runs.forgetHiddenBy(model.oldEdl(), model.newEdl(), model.changeEdl());
+    runs.forgetHiddenBy(model.oldEdl(), model.newEdl(), model.changeEdl(), allowedFrames(model.settings()));
     if (runs.isEmpty())
         model.removeProperty(core::PropertyKey::EarlierRuns);
     else
@@ -332,11 +358,13 @@ void remember(core::PastRuns& runs, DataModel& model)
 class Preparation {
 public:
     /// Throws Failure where the run can't be done, or where it doesn't look as if the user meant it.
-    Preparation(HostedProject& hosted, const ProjectClock& clock, const ApplyOptions& options, Terminal& terminal)
+    /// `lastAllowed` is what the last run of the project could change.
+    Preparation(HostedProject& hosted, const ProjectClock& clock, const ApplyOptions& options,
+                const core::FrameRange& lastAllowed, Terminal& terminal)
         : m_hosted(hosted), m_clock(clock), m_options(options), m_edls(edlsOf(options)), m_facts(hosted.model())
     {
         DataModel& model = hosted.model();
-        core::PastRuns runs = pastRunsOf(model);
+        core::PastRuns runs = pastRunsOf(model, lastAllowed);
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
@@ -349,7 +377,7 @@ public:
         const Plausibility plausibility(model, options.projectFile, m_edls);
         if (source.cuts)
             checkCuts(plausibility, runs, terminal);
-        require(plausibility.doubtOfChanges(runs, !source.cuts), options);
+        require(plausibility.doubtOfChanges(runs, !source.cuts, allowedFrames(model.settings())), options);
         remember(runs, model);
         plan(source.cuts.has_value());
         if (source.cuts) {
@@ -367,7 +395,7 @@ private:
 
     void checkCuts(const Plausibility& plausibility, const core::PastRuns& runs, Terminal& terminal)
     {
-        require(plausibility.doubtOfLastCut(runs), m_options);
+        require(plausibility.doubtOfLastCut(runs, readFrames(m_hosted.model())), m_options);
         require(plausibility.doubtOfNames(), m_options);
         require(plausibility.doubtOfSound(m_hosted.project()), m_options);
         if (const auto dull = plausibility.dullNames()) {
@@ -500,9 +528,10 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     hosted.endPreview();
     if (options.isFresh)
         forgetStored(hosted.model());
+    const core::FrameRange lastAllowed = allowedFrames(hosted.model().settings());
     configure(hosted.model().settings(), options.generation.settings);
     restrictRange(hosted.model().settings(), options.generation.settings.preserve);
-    Preparation run(hosted, clock, options, terminal);
+    Preparation run(hosted, clock, options, lastAllowed, terminal);
     ApplyFacts& facts = run.facts();
 
     std::optional<Interruption> interruption(std::in_place);

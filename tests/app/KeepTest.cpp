@@ -778,6 +778,51 @@ TEST(Plausibility, TheChangeEdlOfTwoCutsAndTheCutsThemselvesAreTheSameRun)
     expectRefusedAgain(job, cuts, why);
 }
 
+TEST(Plausibility, ARestrictedRunIsKnownForWhatItIs)
+{
+    const Reel changed =
+        Reel(Hour).shot("N", 50, 2).shot("A", 102, 8).shot("B", 200, 10).shot("C", 300, 8).shot("M", 60, 2);
+    const Job job(threeShots(), changed, soundOfThreeShots());
+    const Words cuts{"--old", job.oldFile, "--new", job.newFile};
+    const auto within = [&](const Words& range) {
+        Words words = cuts;
+        words.insert(words.end(), {"--preserve"});
+        words.insert(words.end(), range.begin(), range.end());
+        return words;
+    };
+    const auto later = job.folder.write(
+        "later.edl",
+        Reel(Hour).shot("N", 50, 2).shot("A", 102, 8).shot("B", 200, 9).shot("C", 300, 8).shot("M", 60, 2).text());
+    carryOver(job, within({"01:00:00:00", "01:00:15:00"}));
+
+    // Neither is the sound as it was before, nor all of it as it is to be.
+    expectRefusedAgain(job, within({"01:00:00:00", "01:00:15:00"}), "they differ first at 01:00:00:00");
+    expectRefusedAgain(job, {"--old", job.newFile, "--new", later, "--no-preserve"},
+                       "they differ first at 01:00:28:00");
+    // The rest of the change goes on from there, and then a further cut does.
+    carryOver(job, within({"01:00:15:00", "01:00:30:00"}));
+    EXPECT_EQ(placesOn("DIA", job.project),
+              (Words{"pop 3598-3599", "a 3602-3610", "b 3610-3620", "c 3620-3628", "tail 3631-3633"}));
+    carryOver(job, {"--old", job.newFile, "--new", later, "--no-preserve"});
+}
+
+TEST(Plausibility, ARunThatAppliedNothingUnderARestrictedRangeIsNoRunOfTheWholeChange)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    const Words cuts{"--old", job.oldFile, "--new", job.newFile};
+    Words restricted = cuts;
+    restricted.insert(restricted.end(), {"--preserve", "01:00:00:00", "01:00:10:00"});
+    carryOver(job, restricted);
+
+    expectRefusedAgain(job, {"--old", job.newFile, "--new", job.oldFile, "--no-preserve"},
+                       "they differ first at 01:00:10:00");
+    Words whole = cuts;
+    whole.emplace_back("--no-preserve");
+    carryOver(job, whole);
+    EXPECT_EQ(placesOn("DIA", job.project),
+              (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3624", "c 3624-3634", "tail 3635-3637"}));
+}
+
 TEST(Plausibility, ReelTwoAfterReelOneIsNoDoubt)
 {
     json sound = soundOfThreeShots();
