@@ -91,8 +91,11 @@ std::vector<std::string> leftOver(const std::string& path, const std::vector<std
     const fs::path file(path);
     const std::string start = file.stem().string() + "_";
     const std::string end = file.extension().string();
+    // The parts of NAME_backup.edl would be named like what is kept of NAME.edl.
+    const bool isNamedLikeABackup = file.stem().string().ends_with("_backup");
     const auto isPart = [&](const std::string& name) {
-        return name.size() > start.size() + end.size() && name.starts_with(start) && name.ends_with(end) &&
+        return !isNamedLikeABackup && name.size() > start.size() + end.size() && name.starts_with(start) &&
+               name.ends_with(end) &&
                isPartNumber(std::string_view(name).substr(start.size(), name.size() - start.size() - end.size()));
     };
     std::error_code error;
@@ -129,7 +132,7 @@ std::string writtenText(const GenerateOptions& options, const Files& files)
     };
     return (written.empty() ? "Written     nothing; give -o CHANGE.edl\n" : line("Written     ", written, "")) +
            line("Backup      ", files.backups, "") +
-           line("Left over   ", files.leftOver, ", of an earlier list; remove what you don't need");
+           line("Left over   ", files.leftOver, ", which may be of an earlier list; remove what you don't need");
 }
 
 void writeJson(Output& output, const DataModel& model, const GenerationReport& report, const std::string& rate,

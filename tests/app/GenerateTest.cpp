@@ -294,7 +294,7 @@ TEST(Generate, PartsOfAnEarlierLongerListStayAndAreNamed)
     film.folder.write("change_10.edl", "tenth");
     for (const char* const other : {"change_.edl", "change_03.edl", "change_3b.edl", "change_3.txt", "rechange_3.edl"})
         film.folder.write(other, "another");
-    const std::string remark = ", of an earlier list; remove what you don't need\n";
+    const std::string remark = ", which may be of an earlier list; remove what you don't need\n";
 
     const std::string inTwo = generate("none").out;
     EXPECT_TRUE(inTwo.ends_with("Left over   " + path("change_3.edl") + ", " + path("change_10.edl") + remark))
