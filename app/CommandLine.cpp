@@ -357,6 +357,7 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
         ->add_option_function<std::string>(
             "--keep",
             [&options](const std::string& word) {
+                options.isKeepGiven = true;
                 options.keep = static_cast<ApplyOptions::Keep>(numberOf(word, KeepWords));
             },
             "What stays where the cuts don't speak of a change: all (default), or what the change EDL says (cut)")
@@ -475,6 +476,15 @@ void requireKnownWords(const CLI::App& program, const std::vector<std::string>& 
     }
 }
 
+/// Throws UsageError where `apply` is given both a change EDL and a cut: the parser may ask for the other cut instead.
+void requireOneSource(const CLI::App& apply)
+{
+    const auto isGiven = [&apply](const char* name) { return apply.get_option(name)->count() > 0; };
+    if (isGiven("--change") && (isGiven("--old") || isGiven("--new")))
+        throw UsageError{"apply: --change stands instead of --old and --new",
+                         "give the two cuts, or the change EDL alone"};
+}
+
 } // namespace
 
 std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
@@ -495,6 +505,7 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
     } catch (const CLI::ParseError& error) {
         if (error.get_exit_code() != 0) {
             requireKnownWords(program, {argv + 1, argv + argc});
+            requireOneSource(*apply);
             throw UsageError{error.what()};
         }
         program.exit(error); // --help and --version

@@ -237,11 +237,14 @@ ProgrammeShift shiftOf(const DataModel& model, const KeptRun* kept, double origi
     return shift;
 }
 
-/// Throws the failure unless the user has said to go on.
-void require(const std::optional<Failure>& doubt, const ApplyOptions& options)
+/// Throws the failure, or warns of it when the user has said to go on.
+void require(const std::optional<Failure>& doubt, const ApplyOptions& options, Terminal& terminal)
 {
-    if (doubt && !options.isForced)
+    if (!doubt)
+        return;
+    if (!options.isForced)
         throw *doubt;
+    terminal.warn({doubt->file, doubt->problem, "--force goes on all the same"});
 }
 
 /// What a run leaves of a marker of an earlier one; `changed` in seconds of the project.
@@ -354,6 +357,16 @@ void remember(core::PastRuns& runs, DataModel& model)
         model.setProperty(core::PropertyKey::EarlierRuns, core::Variant(runs.toBytes()));
 }
 
+/// Adds what isn't stored with the project.
+void addChoices(SettingsReport& settings, const ApplyOptions& options)
+{
+    using Origin = SettingsReport::Origin;
+    const std::string kept = options.keep == ApplyOptions::Keep::All ? "all" : "cut";
+    settings.add({"keep", "--keep " + kept, kept, options.isKeepGiven ? Origin::CommandLine : Origin::Default});
+    settings.add({"force", options.isForced ? "--force" : "", options.isForced,
+                  options.isForced ? Origin::CommandLine : Origin::Default});
+}
+
 /// What the run is going to be, and what is known of it before.
 class Preparation {
 public:
@@ -372,16 +385,17 @@ public:
         m_facts.changeUnread = source.files.unread;
         m_facts.settings.emplace(model.settings(), options.generation.settings, source.cuts.has_value(),
                                  timeText(hosted.project(), clock));
+        addChoices(*m_facts.settings, options);
         m_facts.written = targetOf(options);
         m_facts.jsonFile = Output::isFile(options.jsonFile) ? options.jsonFile : std::string();
         const Plausibility plausibility(model, options.projectFile, m_edls);
         if (source.cuts)
             checkCuts(plausibility, runs, terminal);
-        require(plausibility.doubtOfChanges(runs, !source.cuts, allowedFrames(model.settings())), options);
+        require(plausibility.doubtOfChanges(runs, !source.cuts, allowedFrames(model.settings())), options, terminal);
         remember(runs, model);
         plan(source.cuts.has_value());
         if (source.cuts) {
-            require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options);
+            require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options, terminal);
             m_facts.generation.emplace(model, isPlanned(source) ? m_kept->carried() : model.changeEdl(), *source.cuts,
                                        Timecode::framerate());
         }
@@ -395,9 +409,9 @@ private:
 
     void checkCuts(const Plausibility& plausibility, const core::PastRuns& runs, Terminal& terminal)
     {
-        require(plausibility.doubtOfLastCut(runs, readFrames(m_hosted.model())), m_options);
-        require(plausibility.doubtOfNames(), m_options);
-        require(plausibility.doubtOfSound(m_hosted.project()), m_options);
+        require(plausibility.doubtOfLastCut(runs, readFrames(m_hosted.model())), m_options, terminal);
+        require(plausibility.doubtOfNames(), m_options, terminal);
+        require(plausibility.doubtOfSound(m_hosted.project()), m_options, terminal);
         if (const auto dull = plausibility.dullNames()) {
             terminal.warn(dull->warning);
             m_facts.matchText = dull->summary;

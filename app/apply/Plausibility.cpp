@@ -177,7 +177,9 @@ std::optional<Plausibility::DullNames> Plausibility::dullNames() const
         std::max_element(names.begin(), names.end(), [](const auto& a, const auto& b) { return a.second < b.second; });
     const auto& [name, count] = *most;
     const bool isAuxiliary = name == "AX" && count == all;
-    if (!isAuxiliary && (all < FewestEventsForAName || 2 * count < all))
+    // Where each cut is one event, there is nothing to tell apart.
+    const bool isOneName = count == all && all > 2;
+    if (!isAuxiliary && !isOneName && (all < FewestEventsForAName || 2 * count < all))
         return std::nullopt;
     const std::string kind = isByClip ? "clip name" : "roll name";
     const std::size_t telling = all - count;

@@ -308,6 +308,7 @@ Covered     00:00:28:00 of 00:00:32:00, 87.5 %
 Settings    default       --tracks all --match roll --heal normal --vfx none --no-overhang --overhang-percent 50
                           --remains 5 --no-virgin-territories --no-preserve --destination-markers --insert-markers
                           --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll
+                          --keep all
 Applied     2 events
 Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 in no cut
 Own markers 3: 1 stay, 1 moved, 1 in no cut
@@ -773,16 +774,17 @@ TEST(Apply, TheReportTellsEachSettingAndWhereItIsFrom)
         "command line  --vfx 'V*_,' --remains 5\n"
         "default       --tracks all --match roll --heal normal --no-overhang --overhang-percent 50\n"
         "              --no-virgin-territories --no-preserve --destination-markers --insert-markers\n"
-        "              --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll\n");
+        "              --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll\n"
+        "              --keep all\n");
 
     const Outcome later = runCadrel({"apply", result, "--change", scene.folder.write("change.edl", newCut()), "--force",
                                      "--no-b-roll", "--overhang", "3", "--summary"});
     // A change EDL that is there isn't made by the VFX patterns.
     EXPECT_EQ(settingsIn(later.out),
-              "command line  --overhang 3 --no-b-roll\n"
+              "command line  --overhang 3 --no-b-roll --force\n"
               "default       --tracks all --match roll --overhang-percent 50 --remains 5 --no-virgin-territories\n"
               "              --no-preserve --destination-markers --insert-markers --dissolve-wipe-markers\n"
-              "              --automation-markers --snippet-markers --overlap-markers\n")
+              "              --automation-markers --snippet-markers --overlap-markers --keep all\n")
         << later.err;
 }
 
@@ -808,7 +810,7 @@ TEST(Apply, TheJsonTellsEachSettingAndWhereItIsFrom)
                       "A,B",
                       "--vfx",
                       "C,"};
-    const auto settingsOf = [&](const std::string& from) {
+    const auto settingsOf = [&](const std::string& from, bool isForced) {
         return json{{"tracks", {{"value", "selected"}, {"from", from}}},
                     {"match", {{"value", "clip"}, {"from", from}}},
                     {"heal", {{"value", "normal"}, {"from", "default"}}},
@@ -824,13 +826,36 @@ TEST(Apply, TheJsonTellsEachSettingAndWhereItIsFrom)
                     {"automation-markers", {{"value", true}, {"from", "default"}}},
                     {"snippet-markers", {{"value", true}, {"from", "default"}}},
                     {"overlap-markers", {{"value", true}, {"from", "default"}}},
-                    {"b-roll", {{"value", false}, {"from", from}}}};
+                    {"b-roll", {{"value", false}, {"from", from}}},
+                    {"keep", {{"value", "all"}, {"from", "default"}}},
+                    {"force", {{"value", isForced}, {"from", isForced ? "command line" : "default"}}}};
     };
     Words inPlace = given;
     inPlace.emplace_back("--in-place");
 
-    EXPECT_EQ(scene.applyAsJson(inPlace).at("settings"), settingsOf("command line"));
-    EXPECT_EQ(scene.applyAsJson({"--force"}).at("settings"), settingsOf("project"));
+    EXPECT_EQ(scene.applyAsJson(inPlace).at("settings"), settingsOf("command line", false));
+    EXPECT_EQ(scene.applyAsJson({"--force"}).at("settings"), settingsOf("project", true));
+}
+
+TEST(Apply, AChangeEdlBesideACutIsNamedAsTheMistake)
+{
+    const Scene scene;
+    for (const char* const cut : {"--old", "--new"}) {
+        const Outcome outcome = runCadrel({"apply", scene.project, "--change", scene.newFile, cut, scene.newFile});
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.err, "cadrel: apply: --change stands instead of --old and --new; give the two cuts, or the "
+                               "change EDL alone\n");
+    }
+}
+
+TEST(Apply, TheReportTellsWhatWasToBeKept)
+{
+    const Scene scene;
+
+    EXPECT_TRUE(tells(settingsIn(scene.apply({"--keep", "cut"}).out), "command line  --keep cut\n"));
+    EXPECT_TRUE(tells(settingsIn(scene.apply({"--keep", "all"}).out), "command line  --keep all\n"));
+    EXPECT_EQ(scene.applyAsJson({"--keep", "cut"}).at("settings").at("keep"),
+              (json{{"value", "cut"}, {"from", "command line"}}));
 }
 
 TEST(Apply, WhatIsNotGivenIsAsInTheLastRun)

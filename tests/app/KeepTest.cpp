@@ -646,6 +646,31 @@ TEST(Keep, ATailThatFindsNoRoomIsToldAsLost)
     EXPECT_EQ(report["lost"][0].at("out").at("timecode"), "01:01:20:00");
 }
 
+TEST(Keep, OfManyStretchesThatAreLostTenAreListedAndTheRestIsCounted)
+{
+    const auto lossesOf = [](int count) {
+        // Of each shot a part is named by the change EDL, and the clips between those parts go.
+        std::string change = "TITLE: CHANGE\n";
+        std::vector<json> clips;
+        for (int index = 0; index <= count; ++index) {
+            const double start = Hour + 10 * index;
+            change += cut("001", "A", timecode(start) + " " + timecode(start + 5),
+                          timecode(start + 3600) + " " + timecode(start + 3605));
+            clips.push_back(clip("a", start + 6, start + 8));
+        }
+        clips.pop_back();
+        const Job job(threeShots(), threeShots(), json::array({audioTrack("DIA", clips)}));
+        const Outcome outcome =
+            runCadrel({"apply", job.project, "--change", job.folder.write("change.edl", change), "--force"});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return outcome.out;
+    };
+
+    EXPECT_FALSE(tells(lossesOf(10), "--json lists them all"));
+    EXPECT_TRUE(
+        tells(lossesOf(11), "which the change EDL carries nowhere\n            and 1 more; --json lists them all\n"));
+}
+
 /// Whether a run is refused with those words, writes nothing, and goes on when it is forced.
 void expectDoubt(const Job& job, const std::string& words)
 {
@@ -656,6 +681,8 @@ void expectDoubt(const Job& job, const std::string& words)
     EXPECT_FALSE(std::filesystem::exists(job.result));
     const Outcome forced = job.run({"--force"});
     EXPECT_EQ(forced.status, 0) << forced.err;
+    EXPECT_TRUE(tells(forced.err, "warning: " + words.substr(0, words.find(';')))) << forced.err;
+    EXPECT_TRUE(tells(forced.err, "; --force goes on all the same\n")) << forced.err;
 }
 
 /// Runs, and puts the result in the place of the project.
@@ -876,6 +903,16 @@ TEST(Plausibility, NamesThatTellNothingAreWarnedOf)
         << outcome.err;
     EXPECT_TRUE(tells(outcome.out, "Match       roll names that tell the material: 0 of 6 events, 0 %\n"))
         << outcome.out;
+}
+
+TEST(Plausibility, OneNameForAllOfThreeEventsIsWarnedOf)
+{
+    const json sound = json::array({audioTrack("DIA", {clip("a", Hour, Hour + 20)})});
+    const Reel one = Reel(Hour).shot("SAME", 100, 10);
+    const Reel two = Reel(Hour).shot("SAME", 100, 10).shot("SAME", 200, 10);
+
+    EXPECT_TRUE(tells(Job(one, two, sound).run().err, "3 of 3 events have the roll name SAME"));
+    EXPECT_EQ(Job(one, one, sound).run().err, "");
 }
 
 TEST(Plausibility, OneNameForHalfOfTheEventsIsWarnedOf)
