@@ -313,6 +313,17 @@ TEST(Generate, PartsOfAnEarlierLongerListStayAndAreNamed)
     EXPECT_EQ(contentOf(path("change_10.edl")), "tenth");
 }
 
+TEST(Generate, ABackupIsNoPartOfAnEarlierList)
+{
+    const Film film(oldCut(), newCut());
+    film.folder.write("change_backup_1.edl", "former");
+
+    const Outcome outcome = film.generate({"-o", film.folder / "change_backup.edl"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(outcome.out.find("Left over"), std::string::npos) << outcome.out;
+}
+
 TEST(Generate, AnInputIsNoPartOfAnEarlierList)
 {
     const TempFolder folder;
