@@ -138,8 +138,15 @@ void addOutput(CLI::App& command, const char* name, std::string& file, const cha
 void addResult(CLI::App& command, std::string& file, Replacing& replacing, const char* help)
 {
     addOutput(command, "-o,--output", file, help);
-    command.add_flag("--overwrite", replacing.isAllowed, "Replace the file of -o where it exists");
+    command.add_flag("--overwrite", replacing.isAllowed, "Replace files that exist");
     command.add_flag("--backup", replacing.keepsFormer, "Keep what is replaced, as NAME_backup_1 and so on");
+}
+
+/// JSON beside what the command prints.
+void addJson(CLI::App& command, std::string& file, bool& isReplacing, const char* help)
+{
+    addOutput(command, "--json", file, help);
+    command.add_flag("--overwrite", isReplacing, "Replace the file of --json where it exists");
 }
 
 CLI::Option* addFiles(CLI::App& command, const char* name, std::vector<std::string>& files, const char* help)
@@ -350,6 +357,7 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
         ->add_option_function<std::string>(
             "--keep",
             [&options](const std::string& word) {
+                options.isKeepGiven = true;
                 options.keep = static_cast<ApplyOptions::Keep>(numberOf(word, KeepWords));
             },
             "What stays where the cuts don't speak of a change: all (default), or what the change EDL says (cut)")
@@ -403,7 +411,7 @@ CLI::App* addList(CLI::App& program, ListOptions& options)
     list->add_option("FILE", options.files, "EDLs to show")->type_name("")->required();
     list->add_flag("--audio", options.load.acceptAudio, "Accept audio events, as for a change EDL");
     list->add_flag("--summary", options.summary, "Print the totals alone");
-    addOutput(*list, "--json", options.jsonFile, EventsJsonHelp);
+    addJson(*list, options.jsonFile, options.isReplacing, EventsJsonHelp);
     addShift(*list, options.shifts);
     addLoadOptions(*list, options.load);
     list->footer(ListHelp);
@@ -418,7 +426,7 @@ CLI::App* addShow(CLI::App& program, ShowOptions& options)
                      "Show only the tracks of that name; a folder stands for all that is in it")
         ->check(isNamed)
         ->type_name("NAME");
-    addOutput(*show, "--json", options.jsonFile, AllJsonHelp);
+    addJson(*show, options.jsonFile, options.isReplacing, AllJsonHelp);
     show->footer(ShowHelp);
     return show;
 }
@@ -468,6 +476,15 @@ void requireKnownWords(const CLI::App& program, const std::vector<std::string>& 
     }
 }
 
+/// Throws UsageError where `apply` is given both a change EDL and a cut: the parser may ask for the other cut instead.
+void requireOneSource(const CLI::App& apply)
+{
+    const auto isGiven = [&apply](const char* name) { return apply.get_option(name)->count() > 0; };
+    if (isGiven("--change") && (isGiven("--old") || isGiven("--new")))
+        throw UsageError{"apply: --change stands instead of --old and --new",
+                         "give the two cuts, or the change EDL alone"};
+}
+
 } // namespace
 
 std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
@@ -488,6 +505,7 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
     } catch (const CLI::ParseError& error) {
         if (error.get_exit_code() != 0) {
             requireKnownWords(program, {argv + 1, argv + argc});
+            requireOneSource(*apply);
             throw UsageError{error.what()};
         }
         program.exit(error); // --help and --version

@@ -22,6 +22,7 @@
 #include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
+#include "core/keep/Material.h"
 #include "core/keep/PastRuns.h"
 #include "core/model/DataModel.h"
 #include "core/time/SecondsRange.h"
@@ -77,8 +78,10 @@ void checkOutputs(const ApplyOptions& options)
         taken.push_back(options.outputFile);
     }
     taken.push_back(options.projectFile);
-    if (Output::isFile(options.jsonFile))
+    if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite(taken, options.jsonFile);
+        requireReplaceable({options.jsonFile}, options.replacing);
+    }
 }
 
 HostedProject::Opening openingOf(const ApplyOptions& options)
@@ -234,11 +237,14 @@ ProgrammeShift shiftOf(const DataModel& model, const KeptRun* kept, double origi
     return shift;
 }
 
-/// Throws the failure unless the user has said to go on.
-void require(const std::optional<Failure>& doubt, const ApplyOptions& options)
+/// Throws the failure, or warns of it when the user has said to go on.
+void require(const std::optional<Failure>& doubt, const ApplyOptions& options, Terminal& terminal)
 {
-    if (doubt && !options.isForced)
+    if (!doubt)
+        return;
+    if (!options.isForced)
         throw *doubt;
+    terminal.warn({doubt->file, doubt->problem, "--force goes on all the same"});
 }
 
 /// What a run leaves of a marker of an earlier one; `changed` in seconds of the project.
@@ -304,37 +310,74 @@ FrameRanges sourcesOf(const DataModel& model, const KeptRun* kept)
     return sources;
 }
 
-/// The runs that the project has behind it; the lists of the model tell of the last.
-core::PastRuns pastRunsOf(const DataModel& model)
+/// The frames of the new programme that a run with these settings may change.
+core::FrameRange allowedFrames(const Settings& settings)
+{
+    if (!settings.restrictRange())
+        return core::PastRuns::AllTime;
+    const FrameRanges frames = core::framesOfMaterial(
+        {{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()}}, Timecode::framerate());
+    return frames.empty() ? core::FrameRange() : frames.front();
+}
+
+/// The runs that the project has behind it; the lists of the model tell of the last, which could change `allowed`.
+core::PastRuns pastRunsOf(const DataModel& model, const core::FrameRange& allowed)
 {
     const Settings& settings = model.settings();
     core::PastRuns runs({settings.matchBy(), settings.vfxPatterns(), Timecode::framerate()});
     core::Variant stored;
     if (model.getProperty(core::PropertyKey::EarlierRuns, stored) == util::Result::Ok)
         runs.read(stored.toText());
-    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl());
+    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl(), allowed);
     return runs;
+}
+
+/// Where the run of the model's change list finds or leaves sound: what it may change, and where that comes from.
+FrameRanges readFrames(const DataModel& model)
+{
+    const core::FrameRange allowed = allowedFrames(model.settings());
+    FrameRanges frames{allowed};
+    if (allowed == core::PastRuns::AllTime)
+        return frames;
+    for (const auto& event : model.changeEdl().events()) {
+        const auto stretch = core::changeStretchOf(*event, Timecode::framerate());
+        if (stretch)
+            frames.push_back(intersect(stretch->destination, allowed).shiftedBy(-stretch->shift));
+    }
+    return core::united(std::move(frames));
 }
 
 /// Lets the project keep of the runs behind it what that of the model's lists leaves.
 void remember(core::PastRuns& runs, DataModel& model)
 {
-    runs.forgetHiddenBy(model.oldEdl(), model.newEdl(), model.changeEdl());
+    runs.forgetHiddenBy(model.oldEdl(), model.newEdl(), model.changeEdl(), allowedFrames(model.settings()));
     if (runs.isEmpty())
         model.removeProperty(core::PropertyKey::EarlierRuns);
     else
         model.setProperty(core::PropertyKey::EarlierRuns, core::Variant(runs.toBytes()));
 }
 
+/// Adds what isn't stored with the project.
+void addChoices(SettingsReport& settings, const ApplyOptions& options)
+{
+    using Origin = SettingsReport::Origin;
+    const std::string kept = options.keep == ApplyOptions::Keep::All ? "all" : "cut";
+    settings.add({"keep", "--keep " + kept, kept, options.isKeepGiven ? Origin::CommandLine : Origin::Default});
+    settings.add({"force", options.isForced ? "--force" : "", options.isForced,
+                  options.isForced ? Origin::CommandLine : Origin::Default});
+}
+
 /// What the run is going to be, and what is known of it before.
 class Preparation {
 public:
     /// Throws Failure where the run can't be done, or where it doesn't look as if the user meant it.
-    Preparation(HostedProject& hosted, const ProjectClock& clock, const ApplyOptions& options, Terminal& terminal)
+    /// `lastAllowed` is what the last run of the project could change.
+    Preparation(HostedProject& hosted, const ProjectClock& clock, const ApplyOptions& options,
+                const core::FrameRange& lastAllowed, Terminal& terminal)
         : m_hosted(hosted), m_clock(clock), m_options(options), m_edls(edlsOf(options)), m_facts(hosted.model())
     {
         DataModel& model = hosted.model();
-        core::PastRuns runs = pastRunsOf(model);
+        core::PastRuns runs = pastRunsOf(model, lastAllowed);
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
@@ -342,16 +385,17 @@ public:
         m_facts.changeUnread = source.files.unread;
         m_facts.settings.emplace(model.settings(), options.generation.settings, source.cuts.has_value(),
                                  timeText(hosted.project(), clock));
+        addChoices(*m_facts.settings, options);
         m_facts.written = targetOf(options);
         m_facts.jsonFile = Output::isFile(options.jsonFile) ? options.jsonFile : std::string();
         const Plausibility plausibility(model, options.projectFile, m_edls);
         if (source.cuts)
             checkCuts(plausibility, runs, terminal);
-        require(plausibility.doubtOfChanges(runs, !source.cuts), options);
+        require(plausibility.doubtOfChanges(runs, !source.cuts, allowedFrames(model.settings())), options, terminal);
         remember(runs, model);
         plan(source.cuts.has_value());
         if (source.cuts) {
-            require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options);
+            require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options, terminal);
             m_facts.generation.emplace(model, isPlanned(source) ? m_kept->carried() : model.changeEdl(), *source.cuts,
                                        Timecode::framerate());
         }
@@ -365,9 +409,9 @@ private:
 
     void checkCuts(const Plausibility& plausibility, const core::PastRuns& runs, Terminal& terminal)
     {
-        require(plausibility.doubtOfLastCut(runs), m_options);
-        require(plausibility.doubtOfNames(), m_options);
-        require(plausibility.doubtOfSound(m_hosted.project()), m_options);
+        require(plausibility.doubtOfLastCut(runs, readFrames(m_hosted.model())), m_options, terminal);
+        require(plausibility.doubtOfNames(), m_options, terminal);
+        require(plausibility.doubtOfSound(m_hosted.project()), m_options, terminal);
         if (const auto dull = plausibility.dullNames()) {
             terminal.warn(dull->warning);
             m_facts.matchText = dull->summary;
@@ -437,8 +481,13 @@ void writeReport(Output& output, const core::DataModel& model, const ApplyJson& 
 void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, const ApplyOptions& options)
 {
     const std::string& target = targetOf(options);
-    Backups backups(options.replacing.keepsFormer ? std::vector{target} : std::vector<std::string>());
-    facts.backups = backups.names();
+    const auto namesToKeep = [&](const std::string& file) {
+        return options.replacing.keepsFormer ? std::vector{file} : std::vector<std::string>();
+    };
+    Backups formerProject(namesToKeep(target));
+    Backups formerReport(namesToKeep(options.jsonFile));
+    facts.projectBackups = formerProject.names();
+    facts.reportBackups = formerReport.names();
     std::optional<Output> report;
     if (Output::isFile(options.jsonFile)) {
         report.emplace(options.jsonFile);
@@ -452,9 +501,10 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
         hosted.saveOver(target);
     else if (!target.empty())
         hosted.saveAs(target);
-    backups.keep();
+    formerProject.keep();
     if (report)
         report->place();
+    formerReport.keep();
 }
 
 void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyOptions& options)
@@ -492,9 +542,10 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     hosted.endPreview();
     if (options.isFresh)
         forgetStored(hosted.model());
+    const core::FrameRange lastAllowed = allowedFrames(hosted.model().settings());
     configure(hosted.model().settings(), options.generation.settings);
     restrictRange(hosted.model().settings(), options.generation.settings.preserve);
-    Preparation run(hosted, clock, options, terminal);
+    Preparation run(hosted, clock, options, lastAllowed, terminal);
     ApplyFacts& facts = run.facts();
 
     std::optional<Interruption> interruption(std::in_place);

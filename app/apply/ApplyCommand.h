@@ -25,6 +25,7 @@ struct ApplyOptions {
     Replacing replacing;                  ///< of the output; in place the project is replaced anyway
     std::string jsonFile;                 ///< empty: none is written; "-": standard output
     Keep keep = Keep::All;
+    bool isKeepGiven = false;
     bool isForced = false; ///< goes on where the files don't seem to belong together
     bool isFresh = false;  ///< without what earlier runs have stored in the project
     bool inPlace = false;  ///< the result replaces the project

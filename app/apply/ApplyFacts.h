@@ -51,10 +51,11 @@ struct ApplyFacts {
     std::vector<core::SecondsRange> lost; ///< what goes although no picture stands there; by the project's clock
     std::string matchText;                ///< what the match rests on; empty where the names tell the shots apart
     std::vector<TrackComparison> tracks;
-    double seconds = 0.0;             ///< that the run took
-    std::string written;              ///< the project file; empty for none
-    std::vector<std::string> backups; ///< the former file under its new name; empty for none
-    std::string jsonFile;             ///< the file of the report; empty for none
+    double seconds = 0.0;                    ///< that the run took
+    std::string written;                     ///< the project file; empty for none
+    std::vector<std::string> projectBackups; ///< the former file under its new name; empty for none
+    std::string jsonFile;                    ///< the file of the report; empty for none
+    std::vector<std::string> reportBackups;
 };
 
 /// How many clips and markers became what. One that was moved and trimmed counts in both.

@@ -72,7 +72,11 @@ ordered_json ApplyJson::toJson() const
     json["tracks"] = std::move(tracks);
     json["markers"] = std::move(markers);
     json["written"] = m_facts.written.empty() ? ordered_json() : ordered_json(m_facts.written);
-    json["backup"] = m_facts.backups.empty() ? ordered_json() : ordered_json(m_facts.backups.front());
+    const auto firstOf = [](const std::vector<std::string>& names) {
+        return names.empty() ? ordered_json() : ordered_json(names.front());
+    };
+    json["backup"] = firstOf(m_facts.projectBackups);
+    json["reportBackup"] = firstOf(m_facts.reportBackups);
     return json;
 }
 

@@ -143,6 +143,16 @@ std::string eventText(const core::EventBase& event)
            toPrintable(event.rollName(), MostCharactersOfAName).text;
 }
 
+/// Of more there is a count; the JSON has all.
+constexpr std::size_t MostLinesOfAKind = 10;
+
+std::string restText(std::size_t count)
+{
+    return count <= MostLinesOfAKind
+               ? std::string()
+               : "            and " + std::to_string(count - MostLinesOfAKind) + " more; --json lists them all\n";
+}
+
 } // namespace
 
 void ApplyListing::printTotals(std::ostream& out) const
@@ -179,8 +189,12 @@ void ApplyListing::printPassedOver(std::ostream& out) const
     if (m_facts.passedOver.empty())
         return;
     out << "Passed over " << counted(m_facts.passedOver.size(), "event") << '\n';
-    for (const PassedOver& passed : m_facts.passedOver)
+    const std::size_t shown = std::min(m_facts.passedOver.size(), MostLinesOfAKind);
+    for (std::size_t index = 0; index < shown; ++index) {
+        const PassedOver& passed = m_facts.passedOver[index];
         out << "            " << eventText(*passed.event) << ": " << passed.reason << '\n';
+    }
+    out << restText(m_facts.passedOver.size());
 }
 
 void ApplyListing::printLost(std::ostream& out) const
@@ -188,10 +202,13 @@ void ApplyListing::printLost(std::ostream& out) const
     const auto timeText = [this](double seconds) { return m_clock.exactTimecode(seconds - m_facts.timeOrigin); };
     const char* title = "Lost        ";
     const char* const why = m_facts.generation ? ", for want of room\n" : ", which the change EDL carries nowhere\n";
-    for (const core::SecondsRange& range : m_facts.lost) {
+    const std::size_t shown = std::min(m_facts.lost.size(), MostLinesOfAKind);
+    for (std::size_t index = 0; index < shown; ++index) {
+        const core::SecondsRange& range = m_facts.lost[index];
         out << title << timeText(range.start) << " - " << timeText(range.end) << why;
         title = "            ";
     }
+    out << restText(m_facts.lost.size());
 }
 
 void ApplyListing::printClips(std::ostream& out) const
@@ -219,8 +236,10 @@ void ApplyListing::printWritten(std::ostream& out) const
     if (m_facts.written.empty())
         written.emplace_back("no project; give -o PROJECT.stage or --in-place");
     out << "Written     " << joined(written) << '\n';
-    for (const std::string& backup : m_facts.backups)
-        out << "Backup      " << toPrintable(backup).text << '\n';
+    for (const auto* const backups : {&m_facts.projectBackups, &m_facts.reportBackups}) {
+        for (const std::string& backup : *backups)
+            out << "Backup      " << toPrintable(backup).text << '\n';
+    }
 }
 
 void ApplyListing::printTrackTotals(std::ostream& out) const

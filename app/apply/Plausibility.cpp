@@ -101,14 +101,14 @@ Plausibility::Plausibility(const DataModel& model, const std::string& projectFil
 {
 }
 
-std::optional<Failure> Plausibility::doubtOfLastCut(const PastRuns& runs) const
+std::optional<Failure> Plausibility::doubtOfLastCut(const PastRuns& runs, const FrameRanges& asked) const
 {
     // A project doesn't store which shots are reversed.
     EventList oldCut;
     oldCut.copyFrom(m_model.oldEdl());
     for (const auto& event : oldCut.events())
         event->setReversed(false);
-    const std::optional<std::int32_t> difference = runs.firstDifference(oldCut);
+    const std::optional<std::int32_t> difference = runs.firstDifference(oldCut, asked);
     if (!difference)
         return std::nullopt;
     return Failure{m_projectFile,
@@ -117,9 +117,9 @@ std::optional<Failure> Plausibility::doubtOfLastCut(const PastRuns& runs) const
                    "give that cut with --old, take the project as it was before, or give --force"};
 }
 
-std::optional<Failure> Plausibility::doubtOfChanges(const PastRuns& runs, bool isGiven) const
+std::optional<Failure> Plausibility::doubtOfChanges(const PastRuns& runs, bool isGiven, const FrameRange& allowed) const
 {
-    if (!runs.haveCarriedOut(m_model.changeEdl(), isGiven))
+    if (!runs.haveCarriedOut(m_model.changeEdl(), isGiven, allowed))
         return std::nullopt;
     return Failure{m_inputs, "this change has been carried out in the project already",
                    "take the project as it was before, or give --force"};
@@ -177,7 +177,9 @@ std::optional<Plausibility::DullNames> Plausibility::dullNames() const
         std::max_element(names.begin(), names.end(), [](const auto& a, const auto& b) { return a.second < b.second; });
     const auto& [name, count] = *most;
     const bool isAuxiliary = name == "AX" && count == all;
-    if (!isAuxiliary && (all < FewestEventsForAName || 2 * count < all))
+    // Where each cut is one event, there is nothing to tell apart.
+    const bool isOneName = count == all && all > 2;
+    if (!isAuxiliary && !isOneName && (all < FewestEventsForAName || 2 * count < all))
         return std::nullopt;
     const std::string kind = isByClip ? "clip name" : "roll name";
     const std::size_t telling = all - count;

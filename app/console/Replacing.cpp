@@ -31,8 +31,12 @@ bool takesName(const fs::path& file, const fs::path& name)
     fs::create_hard_link(file, name, error);
     if (!error)
         return true;
-    if (error != std::errc::file_exists)
+    if (error != std::errc::file_exists) {
         fs::copy_file(file, name, error);
+        std::error_code ignored;
+        if (error && error != std::errc::file_exists)
+            fs::remove(name, ignored);
+    }
     if (error && error != std::errc::file_exists)
         throw unwritable({name.string()});
     return !error;

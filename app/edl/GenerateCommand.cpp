@@ -40,12 +40,14 @@ namespace fs = std::filesystem;
 
 namespace {
 
-/// Throws UsageError when one of the change EDL's files, or the JSON file, would overwrite another file of this run.
+/// Throws UsageError when one of the change EDL's files, or the JSON file, would overwrite another file of this run, and
+/// Failure when the JSON file would overwrite one that the user hasn't given up.
 void checkOutputs(const GenerateOptions& options, const std::vector<std::string>& changeFiles)
 {
     std::vector<std::string> taken = inputsOf(options.generation);
     if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite(taken, options.jsonFile);
+        requireReplaceable({options.jsonFile}, options.replacing);
         taken.push_back(options.jsonFile);
     }
     for (const std::string& file : changeFiles)
@@ -89,8 +91,11 @@ std::vector<std::string> leftOver(const std::string& path, const std::vector<std
     const fs::path file(path);
     const std::string start = file.stem().string() + "_";
     const std::string end = file.extension().string();
+    // The parts of NAME_backup.edl would be named like what is kept of NAME.edl.
+    const bool isNamedLikeABackup = file.stem().string().ends_with("_backup");
     const auto isPart = [&](const std::string& name) {
-        return name.size() > start.size() + end.size() && name.starts_with(start) && name.ends_with(end) &&
+        return !isNamedLikeABackup && name.size() > start.size() + end.size() && name.starts_with(start) &&
+               name.ends_with(end) &&
                isPartNumber(std::string_view(name).substr(start.size(), name.size() - start.size() - end.size()));
     };
     std::error_code error;
@@ -127,7 +132,7 @@ std::string writtenText(const GenerateOptions& options, const Files& files)
     };
     return (written.empty() ? "Written     nothing; give -o CHANGE.edl\n" : line("Written     ", written, "")) +
            line("Backup      ", files.backups, "") +
-           line("Left over   ", files.leftOver, ", of an earlier list; remove what you don't need");
+           line("Left over   ", files.leftOver, ", which may be of an earlier list; remove what you don't need");
 }
 
 void writeJson(Output& output, const DataModel& model, const GenerationReport& report, const std::string& rate,
@@ -166,7 +171,10 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     std::optional<Interruption> interruption;
     if (!files.change.empty() || Output::isFile(options.jsonFile))
         interruption.emplace();
-    Backups backups(options.replacing.keepsFormer ? files.change : std::vector<std::string>());
+    std::vector<std::string> written = files.change;
+    if (Output::isFile(options.jsonFile))
+        written.push_back(options.jsonFile);
+    Backups backups(options.replacing.keepsFormer ? written : std::vector<std::string>());
     files.backups = backups.names();
     std::vector<std::string> used = inputsOf(options.generation);
     used.insert(used.end(), files.change.begin(), files.change.end());

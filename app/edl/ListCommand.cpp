@@ -6,6 +6,7 @@
 #include "app/console/Interruption.h"
 #include "app/console/Output.h"
 #include "app/console/Paths.h"
+#include "app/console/Replacing.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
 #include "app/edl/EventJson.h"
@@ -117,8 +118,10 @@ void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const 
 void runList(const ListOptions& options, Terminal& terminal)
 {
     const bool jsonOnly = Output::isStandardOutput(options.jsonFile);
-    if (!options.jsonFile.empty() && !jsonOnly)
+    if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite(options.files, options.jsonFile);
+        requireReplaceable({options.jsonFile}, {.isAllowed = options.isReplacing});
+    }
     LoadOptions load = options.load;
     load.shifts = FileShifts(options.shifts, options.files);
     const EdlLoader loader(load, terminal);

@@ -13,8 +13,9 @@ class Terminal;
 
 struct ListOptions {
     std::vector<std::string> files;
-    std::string jsonFile; ///< empty: none is written; "-": standard output
-    bool summary = false; ///< the totals alone
+    std::string jsonFile;     ///< empty: none is written; "-": standard output
+    bool isReplacing = false; ///< whether a JSON file that exists may be replaced
+    bool summary = false;     ///< the totals alone
     LoadOptions load;
     std::vector<std::string> shifts; ///< for FileShifts
 };

@@ -7,6 +7,7 @@
 #include "app/console/Output.h"
 #include "app/console/Paths.h"
 #include "app/console/Printable.h"
+#include "app/console/Replacing.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
 #include "app/project/ProjectAccess.h"
@@ -128,8 +129,10 @@ void print(Project& project, const ProjectClock& clock, const StoredModel& store
 void runShow(const ShowOptions& options, Terminal& terminal)
 {
     const bool jsonOnly = Output::isStandardOutput(options.jsonFile);
-    if (!options.jsonFile.empty() && !jsonOnly)
+    if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite({options.projectFile}, options.jsonFile);
+        requireReplaceable({options.jsonFile}, {.isAllowed = options.isReplacing});
+    }
     Project& project = read(options.projectFile, terminal);
     const ProjectClock clock = clockOf(project, options.projectFile);
     const StoredModel stored(project, clock);

@@ -10,8 +10,9 @@ class Terminal;
 
 struct ShowOptions {
     std::string projectFile;
-    std::string trackName; ///< empty: all tracks
-    std::string jsonFile;  ///< empty: none is written; "-": standard output
+    std::string trackName;    ///< empty: all tracks
+    std::string jsonFile;     ///< empty: none is written; "-": standard output
+    bool isReplacing = false; ///< whether a JSON file that exists may be replaced
 };
 
 /// `cadrel show`: what is in a sound project. Throws Failure and UsageError.

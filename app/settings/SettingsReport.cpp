@@ -151,7 +151,7 @@ std::string SettingsReport::text(const std::string& title) const
     for (const Origin origin : {Origin::CommandLine, Origin::Project, Origin::Default}) {
         std::string line;
         for (const Line& setting : m_lines) {
-            if (setting.origin != origin)
+            if (setting.origin != origin || setting.option.empty())
                 continue;
             const std::string option = toPrintable(setting.option).text;
             if (line.empty()) {

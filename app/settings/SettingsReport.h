@@ -7,6 +7,7 @@
 #include <functional>
 #include <nlohmann/json.hpp>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::app {
@@ -19,10 +20,20 @@ public:
     /// A time of the settings, which is in seconds, as a report writes it.
     using TimeText = std::function<std::string(double)>;
 
+    struct Line {
+        std::string name;
+        std::string option; ///< empty for one that the text leaves out
+        nlohmann::ordered_json value;
+        Origin origin;
+    };
+
     /// `isGenerated` is false for a run of a change EDL that was there, which has no use for how one is made. A value is the
     /// project's where it isn't the default and wasn't given.
     SettingsReport(const core::Settings& settings, const GivenSettings& given, bool isGenerated,
                    const TimeText& timeText);
+
+    /// A choice that isn't one of the settings, after them.
+    void add(Line line) { m_lines.push_back(std::move(line)); }
 
     /// Lines of a title, such as "Settings    ", and the options that give these values, by where they are from.
     std::string text(const std::string& title) const;
@@ -30,13 +41,6 @@ public:
     nlohmann::ordered_json toJson() const;
 
 private:
-    struct Line {
-        std::string name;
-        std::string option;
-        nlohmann::ordered_json value;
-        Origin origin;
-    };
-
     std::vector<Line> m_lines;
 };
 

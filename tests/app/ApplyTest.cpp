@@ -308,6 +308,7 @@ Covered     00:00:28:00 of 00:00:32:00, 87.5 %
 Settings    default       --tracks all --match roll --heal normal --vfx none --no-overhang --overhang-percent 50
                           --remains 5 --no-virgin-territories --no-preserve --destination-markers --insert-markers
                           --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll
+                          --keep all
 Applied     2 events
 Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 in no cut
 Own markers 3: 1 stay, 1 moved, 1 in no cut
@@ -400,7 +401,7 @@ TEST(Apply, TheProjectStaysBesideAnOutput)
     EXPECT_TRUE(tells(scene.apply({"--json", document}).out,
                       "Written     " + document.string() + ", no project; give -o PROJECT.stage or --in-place\n"));
 
-    const Outcome outcome = scene.apply({"-o", result, "--json", document, "--summary"});
+    const Outcome outcome = scene.apply({"-o", result, "--json", document, "--overwrite", "--summary"});
 
     EXPECT_EQ(contentOf(scene.project), before);
     EXPECT_EQ(json::parse(contentOf(document)).at("written"), result.string());
@@ -773,16 +774,17 @@ TEST(Apply, TheReportTellsEachSettingAndWhereItIsFrom)
         "command line  --vfx 'V*_,' --remains 5\n"
         "default       --tracks all --match roll --heal normal --no-overhang --overhang-percent 50\n"
         "              --no-virgin-territories --no-preserve --destination-markers --insert-markers\n"
-        "              --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll\n");
+        "              --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll\n"
+        "              --keep all\n");
 
     const Outcome later = runCadrel({"apply", result, "--change", scene.folder.write("change.edl", newCut()), "--force",
                                      "--no-b-roll", "--overhang", "3", "--summary"});
     // A change EDL that is there isn't made by the VFX patterns.
     EXPECT_EQ(settingsIn(later.out),
-              "command line  --overhang 3 --no-b-roll\n"
+              "command line  --overhang 3 --no-b-roll --force\n"
               "default       --tracks all --match roll --overhang-percent 50 --remains 5 --no-virgin-territories\n"
               "              --no-preserve --destination-markers --insert-markers --dissolve-wipe-markers\n"
-              "              --automation-markers --snippet-markers --overlap-markers\n")
+              "              --automation-markers --snippet-markers --overlap-markers --keep all\n")
         << later.err;
 }
 
@@ -808,7 +810,7 @@ TEST(Apply, TheJsonTellsEachSettingAndWhereItIsFrom)
                       "A,B",
                       "--vfx",
                       "C,"};
-    const auto settingsOf = [&](const std::string& from) {
+    const auto settingsOf = [&](const std::string& from, bool isForced) {
         return json{{"tracks", {{"value", "selected"}, {"from", from}}},
                     {"match", {{"value", "clip"}, {"from", from}}},
                     {"heal", {{"value", "normal"}, {"from", "default"}}},
@@ -824,13 +826,36 @@ TEST(Apply, TheJsonTellsEachSettingAndWhereItIsFrom)
                     {"automation-markers", {{"value", true}, {"from", "default"}}},
                     {"snippet-markers", {{"value", true}, {"from", "default"}}},
                     {"overlap-markers", {{"value", true}, {"from", "default"}}},
-                    {"b-roll", {{"value", false}, {"from", from}}}};
+                    {"b-roll", {{"value", false}, {"from", from}}},
+                    {"keep", {{"value", "all"}, {"from", "default"}}},
+                    {"force", {{"value", isForced}, {"from", isForced ? "command line" : "default"}}}};
     };
     Words inPlace = given;
     inPlace.emplace_back("--in-place");
 
-    EXPECT_EQ(scene.applyAsJson(inPlace).at("settings"), settingsOf("command line"));
-    EXPECT_EQ(scene.applyAsJson({"--force"}).at("settings"), settingsOf("project"));
+    EXPECT_EQ(scene.applyAsJson(inPlace).at("settings"), settingsOf("command line", false));
+    EXPECT_EQ(scene.applyAsJson({"--force"}).at("settings"), settingsOf("project", true));
+}
+
+TEST(Apply, AChangeEdlBesideACutIsNamedAsTheMistake)
+{
+    const Scene scene;
+    for (const char* const cut : {"--old", "--new"}) {
+        const Outcome outcome = runCadrel({"apply", scene.project, "--change", scene.newFile, cut, scene.newFile});
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.err, "cadrel: apply: --change stands instead of --old and --new; give the two cuts, or the "
+                               "change EDL alone\n");
+    }
+}
+
+TEST(Apply, TheReportTellsWhatWasToBeKept)
+{
+    const Scene scene;
+
+    EXPECT_TRUE(tells(settingsIn(scene.apply({"--keep", "cut"}).out), "command line  --keep cut\n"));
+    EXPECT_TRUE(tells(settingsIn(scene.apply({"--keep", "all"}).out), "command line  --keep all\n"));
+    EXPECT_EQ(scene.applyAsJson({"--keep", "cut"}).at("settings").at("keep"),
+              (json{{"value", "cut"}, {"from", "command line"}}));
 }
 
 TEST(Apply, WhatIsNotGivenIsAsInTheLastRun)
@@ -1210,11 +1235,13 @@ TEST(Apply, AFailureLeavesTheFilesAsTheyWere)
     };
     const std::string lost = scene.folder / "none/result.stage";
 
-    fail({"-o", lost, "--json", document}, lost + ": the folder does not exist; make it or give another");
-    fail({"-o", "/dev/full", "--json", document}, "/dev/full: can't be written; see whether the disk is full");
+    fail({"-o", lost, "--overwrite", "--json", document},
+         lost + ": the folder does not exist; make it or give another");
+    fail({"-o", "/dev/full", "--overwrite", "--json", document},
+         "/dev/full: can't be written; see whether the disk is full");
     fail({"--in-place", "--json", "/dev/full"}, "/dev/full: can't be written; see whether the disk is full");
     writeFile(scene.newFile, "");
-    fail({"--in-place", "--json", document}, scene.newFile + ": holds no events; give a CMX EDL");
+    fail({"--in-place", "--overwrite", "--json", document}, scene.newFile + ": holds no events; give a CMX EDL");
 
     EXPECT_EQ(contentOf(scene.project), before);
     EXPECT_EQ(contentOf(document), "former report");
@@ -1326,8 +1353,8 @@ TEST(Apply, AnInterruptionTakesTheRunBackAndLeavesTheFilesAsTheyWere)
     const std::string before = contentOf(scene.project);
     const std::string document = scene.folder.write("report.json", "former report");
 
-    const Outcome outcome =
-        runCadrelInterruptedAt("Processing Project", scene.arguments({"--in-place", "--json", document}));
+    const Outcome outcome = runCadrelInterruptedAt("Processing Project",
+                                                   scene.arguments({"--in-place", "--overwrite", "--json", document}));
 
     EXPECT_EQ(outcome.status, -1);
     EXPECT_FALSE(tells(outcome.out, "Applied")) << outcome.out;

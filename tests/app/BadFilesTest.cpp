@@ -280,8 +280,8 @@ void expectUnwritable(const std::string& path, const std::string& problem, const
 
     expectStopped(with({"-o", path, "--overwrite"}), path + ": " + problem);
     expectStopped(with({"-o", path, "--overwrite", "--json", folder / "change.json"}), path + ": " + problem);
-    expectStopped(with({"-o", folder / "change.edl", "--json", path}), path + ": " + problem);
-    expectStopped(run({"list", oldFile, "--json", path}), path + ": " + problem);
+    expectStopped(with({"-o", folder / "change.edl", "--overwrite", "--json", path}), path + ": " + problem);
+    expectStopped(run({"list", oldFile, "--overwrite", "--json", path}), path + ": " + problem);
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "old.edl"}));
 }
 
@@ -342,7 +342,7 @@ TEST(BadOutput, AnInterruptionLeavesNothingHalfWritten)
         text += cut("001", "A001", "10:00:00:00 10:00:00:12", "01:00:00:00 01:00:00:12");
     const std::string file = folder.write("long.edl", text);
 
-    const Outcome outcome = runCadrelInterrupted({"list", file, "--json", document}, folder);
+    const Outcome outcome = runCadrelInterrupted({"list", file, "--overwrite", "--json", document}, folder);
 
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"change.json", "long.edl"}));
     if (outcome.status == 0)
@@ -429,7 +429,9 @@ TEST(BadOutput, AFormerFileStaysWhenTheRunFails)
         runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", change, "--overwrite", "--json", "/dev/full"})
             .status,
         1);
-    EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", "/dev/full", "--json", document}).status,
+    EXPECT_EQ(runCadrel({"generate", "--old", oldFile, "--new", newFile, "-o", "/dev/full", "--overwrite", "--json",
+                         document})
+                  .status,
               1);
 
     EXPECT_EQ(contentOf(change), "former list");
@@ -503,6 +505,61 @@ TEST(BadOutput, AFileThatExistsIsReplacedOnlyWhenThatIsSaid)
         EXPECT_EQ(folder.names(),
                   (std::vector<std::string>{"new.edl", "old.edl", "result.txt", "result_backup_1.txt"}));
         std::filesystem::remove(folder / "result_backup_1.txt");
+    }
+}
+
+TEST(BadOutput, AJsonFileThatExistsIsReplacedOnlyWhenThatIsSaid)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const std::string project = treePath("examples/tworeels/tworeels.stage");
+    const std::string oldReels = treePath("examples/tworeels/old.edl");
+    const std::string newReels = treePath("examples/tworeels/new.edl");
+    const std::string change = folder / "change.edl";
+    for (const std::vector<std::string>& command :
+         {std::vector<std::string>{"generate", "--old", oldFile, "--new", newFile, "-o", change},
+          std::vector<std::string>{"apply", project, "--old", oldReels, "--new", newReels},
+          std::vector<std::string>{"list", oldFile}, std::vector<std::string>{"show", project}}) {
+        SCOPED_TRACE(command.front());
+        const std::string document = folder.write("a.json", "former");
+        std::vector<std::string> arguments = command;
+        arguments.insert(arguments.end(), {"--json", document});
+
+        expectStopped(runCadrel(arguments),
+                      document + ": exists already; give --overwrite to replace it, or another name");
+        EXPECT_EQ(contentOf(document), "former");
+        EXPECT_FALSE(std::filesystem::exists(change));
+
+        arguments.emplace_back("--overwrite");
+        EXPECT_EQ(runCadrel(arguments).status, 0);
+        EXPECT_TRUE(json::parse(contentOf(document)).is_object());
+        std::filesystem::remove(change);
+    }
+}
+
+TEST(BadOutput, ABackupKeepsTheFormerJsonFileToo)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const std::string project = treePath("examples/tworeels/tworeels.stage");
+    const std::string oldReels = treePath("examples/tworeels/old.edl");
+    const std::string newReels = treePath("examples/tworeels/new.edl");
+    for (std::vector<std::string> arguments :
+         {std::vector<std::string>{"generate", "--old", oldFile, "--new", newFile},
+          std::vector<std::string>{"apply", project, "--old", oldReels, "--new", newReels}}) {
+        SCOPED_TRACE(arguments.front());
+        const std::string document = folder.write("a.json", "former");
+        const std::string backup = folder / "a_backup_1.json";
+        arguments.insert(arguments.end(), {"--json", document, "--overwrite", "--backup"});
+
+        const Outcome outcome = runCadrel(arguments);
+
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        EXPECT_EQ(contentOf(backup), "former");
+        EXPECT_NE(outcome.out.find("Backup      " + backup + "\n"), std::string::npos) << outcome.out;
+        std::filesystem::remove(backup);
     }
 }
 

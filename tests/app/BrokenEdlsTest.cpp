@@ -216,6 +216,7 @@ struct Listing {
     }
 
     std::multiset<std::string> valid;
+    std::multiset<std::string> told; ///< of the valid events: their clip names, and which are reversed
     std::size_t flawed = 0;
     std::size_t unread = 0;
     std::string rate;
@@ -235,6 +236,12 @@ private:
             for (const char* const key : {"roll", "srcIn", "srcOut", "dstIn", "dstOut"})
                 text.append(" ").append(event.at(key).get<std::string>());
             valid.insert(text);
+            const auto clip = event.at("clip").get<std::string>();
+            const auto speed = event.at("speed").get<double>();
+            if (!clip.empty())
+                told.insert(text + " is " + clip);
+            if (speed < 0)
+                told.insert(text + " is reversed");
         }
     }
 
@@ -280,6 +287,15 @@ TEST_P(BrokenEdls, LoseNoEventWithoutAWord)
         const std::size_t told = broken.unread + (broken.flawed > whole.flawed ? broken.flawed - whole.flawed : 0);
         EXPECT_LE(missing.size(), told) << (missing.empty() ? "" : missing.front()) << "\n" << broken.error;
         losses += missing.empty() ? 0U : 1U;
+        const auto firstOnlyIn = [](const auto& some, const auto& others) {
+            std::vector<std::string> only;
+            std::set_difference(some.begin(), some.end(), others.begin(), others.end(), std::back_inserter(only));
+            return only.empty() ? std::string() : only.front();
+        };
+        EXPECT_EQ(firstOnlyIn(broken.told, whole.told), "") << "an event has what is told of another";
+        if (told == 0) {
+            EXPECT_EQ(firstOnlyIn(whole.told, broken.told), "") << "is lost without a word";
+        }
     }
     EXPECT_GE(losses, Breaks.size() / 2) << "most breaks cost an event";
 }

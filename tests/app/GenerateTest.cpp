@@ -294,7 +294,7 @@ TEST(Generate, PartsOfAnEarlierLongerListStayAndAreNamed)
     film.folder.write("change_10.edl", "tenth");
     for (const char* const other : {"change_.edl", "change_03.edl", "change_3b.edl", "change_3.txt", "rechange_3.edl"})
         film.folder.write(other, "another");
-    const std::string remark = ", of an earlier list; remove what you don't need\n";
+    const std::string remark = ", which may be of an earlier list; remove what you don't need\n";
 
     const std::string inTwo = generate("none").out;
     EXPECT_TRUE(inTwo.ends_with("Left over   " + path("change_3.edl") + ", " + path("change_10.edl") + remark))
@@ -311,6 +311,17 @@ TEST(Generate, PartsOfAnEarlierLongerListStayAndAreNamed)
         << inTwoAgain;
     EXPECT_EQ(contentOf(path("change_3.edl")), "third");
     EXPECT_EQ(contentOf(path("change_10.edl")), "tenth");
+}
+
+TEST(Generate, ABackupIsNoPartOfAnEarlierList)
+{
+    const Film film(oldCut(), newCut());
+    film.folder.write("change_backup_1.edl", "former");
+
+    const Outcome outcome = film.generate({"-o", film.folder / "change_backup.edl"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(outcome.out.find("Left over"), std::string::npos) << outcome.out;
 }
 
 TEST(Generate, AnInputIsNoPartOfAnEarlierList)

@@ -646,6 +646,31 @@ TEST(Keep, ATailThatFindsNoRoomIsToldAsLost)
     EXPECT_EQ(report["lost"][0].at("out").at("timecode"), "01:01:20:00");
 }
 
+TEST(Keep, OfManyStretchesThatAreLostTenAreListedAndTheRestIsCounted)
+{
+    const auto lossesOf = [](int count) {
+        // Of each shot a part is named by the change EDL, and the clips between those parts go.
+        std::string change = "TITLE: CHANGE\n";
+        std::vector<json> clips;
+        for (int index = 0; index <= count; ++index) {
+            const double start = Hour + 10 * index;
+            change += cut("001", "A", timecode(start) + " " + timecode(start + 5),
+                          timecode(start + 3600) + " " + timecode(start + 3605));
+            clips.push_back(clip("a", start + 6, start + 8));
+        }
+        clips.pop_back();
+        const Job job(threeShots(), threeShots(), json::array({audioTrack("DIA", clips)}));
+        const Outcome outcome =
+            runCadrel({"apply", job.project, "--change", job.folder.write("change.edl", change), "--force"});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return outcome.out;
+    };
+
+    EXPECT_FALSE(tells(lossesOf(10), "--json lists them all"));
+    EXPECT_TRUE(
+        tells(lossesOf(11), "which the change EDL carries nowhere\n            and 1 more; --json lists them all\n"));
+}
+
 /// Whether a run is refused with those words, writes nothing, and goes on when it is forced.
 void expectDoubt(const Job& job, const std::string& words)
 {
@@ -656,6 +681,8 @@ void expectDoubt(const Job& job, const std::string& words)
     EXPECT_FALSE(std::filesystem::exists(job.result));
     const Outcome forced = job.run({"--force"});
     EXPECT_EQ(forced.status, 0) << forced.err;
+    EXPECT_TRUE(tells(forced.err, "warning: " + words.substr(0, words.find(';')))) << forced.err;
+    EXPECT_TRUE(tells(forced.err, "; --force goes on all the same\n")) << forced.err;
 }
 
 /// Runs, and puts the result in the place of the project.
@@ -778,6 +805,51 @@ TEST(Plausibility, TheChangeEdlOfTwoCutsAndTheCutsThemselvesAreTheSameRun)
     expectRefusedAgain(job, cuts, why);
 }
 
+TEST(Plausibility, ARestrictedRunIsKnownForWhatItIs)
+{
+    const Reel changed =
+        Reel(Hour).shot("N", 50, 2).shot("A", 102, 8).shot("B", 200, 10).shot("C", 300, 8).shot("M", 60, 2);
+    const Job job(threeShots(), changed, soundOfThreeShots());
+    const Words cuts{"--old", job.oldFile, "--new", job.newFile};
+    const auto within = [&](const Words& range) {
+        Words words = cuts;
+        words.insert(words.end(), {"--preserve"});
+        words.insert(words.end(), range.begin(), range.end());
+        return words;
+    };
+    const auto later = job.folder.write(
+        "later.edl",
+        Reel(Hour).shot("N", 50, 2).shot("A", 102, 8).shot("B", 200, 9).shot("C", 300, 8).shot("M", 60, 2).text());
+    carryOver(job, within({"01:00:00:00", "01:00:15:00"}));
+
+    // Neither is the sound as it was before, nor all of it as it is to be.
+    expectRefusedAgain(job, within({"01:00:00:00", "01:00:15:00"}), "they differ first at 01:00:00:00");
+    expectRefusedAgain(job, {"--old", job.newFile, "--new", later, "--no-preserve"},
+                       "they differ first at 01:00:28:00");
+    // The rest of the change goes on from there, and then a further cut does.
+    carryOver(job, within({"01:00:15:00", "01:00:30:00"}));
+    EXPECT_EQ(placesOn("DIA", job.project),
+              (Words{"pop 3598-3599", "a 3602-3610", "b 3610-3620", "c 3620-3628", "tail 3631-3633"}));
+    carryOver(job, {"--old", job.newFile, "--new", later, "--no-preserve"});
+}
+
+TEST(Plausibility, ARunThatAppliedNothingUnderARestrictedRangeIsNoRunOfTheWholeChange)
+{
+    const Job job(threeShots(), withInsert(), soundOfThreeShots());
+    const Words cuts{"--old", job.oldFile, "--new", job.newFile};
+    Words restricted = cuts;
+    restricted.insert(restricted.end(), {"--preserve", "01:00:00:00", "01:00:10:00"});
+    carryOver(job, restricted);
+
+    expectRefusedAgain(job, {"--old", job.newFile, "--new", job.oldFile, "--no-preserve"},
+                       "they differ first at 01:00:10:00");
+    Words whole = cuts;
+    whole.emplace_back("--no-preserve");
+    carryOver(job, whole);
+    EXPECT_EQ(placesOn("DIA", job.project),
+              (Words{"pop 3598-3599", "a 3600-3610", "b 3614-3624", "c 3624-3634", "tail 3635-3637"}));
+}
+
 TEST(Plausibility, ReelTwoAfterReelOneIsNoDoubt)
 {
     json sound = soundOfThreeShots();
@@ -831,6 +903,16 @@ TEST(Plausibility, NamesThatTellNothingAreWarnedOf)
         << outcome.err;
     EXPECT_TRUE(tells(outcome.out, "Match       roll names that tell the material: 0 of 6 events, 0 %\n"))
         << outcome.out;
+}
+
+TEST(Plausibility, OneNameForAllOfThreeEventsIsWarnedOf)
+{
+    const json sound = json::array({audioTrack("DIA", {clip("a", Hour, Hour + 20)})});
+    const Reel one = Reel(Hour).shot("SAME", 100, 10);
+    const Reel two = Reel(Hour).shot("SAME", 100, 10).shot("SAME", 200, 10);
+
+    EXPECT_TRUE(tells(Job(one, two, sound).run().err, "3 of 3 events have the roll name SAME"));
+    EXPECT_EQ(Job(one, one, sound).run().err, "");
 }
 
 TEST(Plausibility, OneNameForHalfOfTheEventsIsWarnedOf)

@@ -101,6 +101,7 @@ public:
         }
         m_current.event = std::make_shared<EventBase>();
         m_isPending = false;
+        m_isAfterUnread = false;
         return *m_current.event;
     }
 
@@ -111,9 +112,12 @@ public:
         m_isPending = true;
     }
 
+    /// An event comes here that isn't read. The lines up to the next event are about that one.
+    void passOver() { m_isAfterUnread = true; }
+
     void addComment(std::string_view line)
     {
-        if (!m_isPending)
+        if (!m_isPending || m_isAfterUnread)
             return;
         if (m_previous.event->eventNumber() != m_current.event->eventNumber())
             m_current.applyComment(line);
@@ -124,16 +128,17 @@ public:
     }
 
     /// The shot that the line speaks of plays backwards: that of the event in hand, or in a transition that of the line with
-    /// the same roll. False when there is none.
+    /// the same roll. False when there is none of the roll that the line names.
     bool reverse(const MotionLine& motion)
     {
-        if (!m_isPending)
+        if (!m_isPending || m_isAfterUnread)
             return false;
         EventBase& current = *m_current.event;
         EventBase& previous = *m_previous.event;
         if (previous.eventNumber() != current.eventNumber()) {
-            current.setReversed(true);
-            return true;
+            const bool isMeant = motion.roll.empty() || motion.roll == current.rollName();
+            current.setReversed(current.isReversed() || isMeant);
+            return isMeant;
         }
         const auto isMeant = [&](const EventBase& event) {
             const bool tellsRoll = previous.rollName() != current.rollName();
@@ -166,6 +171,7 @@ private:
     OpenEvent m_previous;
     OpenEvent m_current;
     bool m_isPending = false;
+    bool m_isAfterUnread = false;
     std::vector<std::shared_ptr<EventBase>> m_events;
 };
 
@@ -186,12 +192,16 @@ try {
             if (readEvent(columns, acceptAudio, event)) {
                 collector.accept(line);
                 readDropFrameMark(columns, line, lineNumber);
-                unread.lookAfterEvent(line, lineNumber, columns.lengthIn(line));
+                if (unread.lookAfterEvent(line, lineNumber, columns.lengthIn(line)) && m_isThorough)
+                    collector.passOver();
             } else {
                 unread.lookAtDropped(line, lineNumber, problemOf(columns));
             }
             return;
         }
+        const auto lookedAs = kind == LineKind::Comment ? UnreadLines::Kind::Comment : UnreadLines::Kind::Other;
+        if (unread.lookAt(line, lineNumber, lookedAs) && m_isThorough)
+            collector.passOver();
         if (kind == LineKind::Comment)
             collector.addComment(line);
         if (m_isThorough && MotionLine::isOne(line)) {
@@ -201,8 +211,6 @@ try {
             else if (motion.isBackwards && !collector.reverse(motion))
                 unread.add(line, lineNumber, "plays no event backwards, since none of its roll stands before it");
         }
-        unread.lookAt(line, lineNumber,
-                      kind == LineKind::Comment ? UnreadLines::Kind::Comment : UnreadLines::Kind::Other);
     });
     events.append(collector.end());
     finishRemarks(path, unread.release());

@@ -2,6 +2,7 @@
 
 #include "core/fileio/UnreadLines.h"
 
+#include "core/fileio/MotionLine.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
@@ -63,6 +64,12 @@ bool hidesANumber(std::string_view text)
     return false;
 }
 
+/// Whether it is what the lines after an event say of it.
+bool saysMoreOfAnEvent(std::string_view text)
+{
+    return MotionLine::isOne(text) || (text.starts_with('*') && text.find("CLIP NAME:") != std::string_view::npos);
+}
+
 /// The line ends within a line are all of the kind that the reader doesn't take for one.
 char innerLineEndOf(std::string_view line)
 {
@@ -76,23 +83,30 @@ std::string_view firstLineOf(std::string_view line)
 
 } // namespace
 
-void UnreadLines::lookAfterEvent(std::string_view line, std::uint32_t number, std::size_t taken)
+bool UnreadLines::lookAfterEvent(std::string_view line, std::uint32_t number, std::size_t taken)
 {
     const std::string_view first = firstLineOf(line);
+    const std::size_t before = m_lines.size();
     if (holdsAnEvent(withoutFront(first, taken)))
         add(first, number, "holds a second event, which isn't read");
     lookAtFurther(line, number, taken);
+    const bool isFound = m_lines.size() > before;
+    if (!isFound && saysMoreOfAnEvent(StringUtil::trimView(withoutFront(first, taken))))
+        add(first, number, "holds a clip name or a motion after the event, which isn't read");
+    return isFound;
 }
 
-void UnreadLines::lookAtDropped(std::string_view line, std::uint32_t number, const std::string& problem)
+bool UnreadLines::lookAtDropped(std::string_view line, std::uint32_t number, const std::string& problem)
 {
     add(firstLineOf(line), number, problem);
     lookAtFurther(line, number, 0);
+    return true;
 }
 
-void UnreadLines::lookAt(std::string_view line, std::uint32_t number, Kind kind)
+bool UnreadLines::lookAt(std::string_view line, std::uint32_t number, Kind kind)
 {
     const std::string_view first = firstLineOf(line);
+    const std::size_t before = m_lines.size();
     if (kind == Kind::Comment) {
         if (!isCommentedOut(first) && holdsAnEvent(first))
             add(first, number, "holds an event in a comment, which isn't read");
@@ -102,6 +116,7 @@ void UnreadLines::lookAt(std::string_view line, std::uint32_t number, Kind kind)
         add(first, number, "begins with no event number and isn't read");
     }
     lookAtFurther(line, number, 0);
+    return m_lines.size() > before;
 }
 
 /// The lines after the first that stand in one line of the reader, because they end in another way than it expects.

@@ -25,12 +25,14 @@ class UnreadLines {
 public:
     enum class Kind { Comment, Other };
 
+    // Each returns whether it has found an event that was not read.
+
     /// A line of which an event was made; `taken` bytes of it are the event's.
-    void lookAfterEvent(std::string_view line, std::uint32_t number, std::size_t taken);
+    bool lookAfterEvent(std::string_view line, std::uint32_t number, std::size_t taken);
     /// A line that begins with a number but makes no event, and why it doesn't.
-    void lookAtDropped(std::string_view line, std::uint32_t number, const std::string& problem);
+    bool lookAtDropped(std::string_view line, std::uint32_t number, const std::string& problem);
     /// Any other line.
-    void lookAt(std::string_view line, std::uint32_t number, Kind kind);
+    bool lookAt(std::string_view line, std::uint32_t number, Kind kind);
 
     void add(std::string_view line, std::uint32_t number, const std::string& problem);
 

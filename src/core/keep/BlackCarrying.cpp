@@ -3,8 +3,10 @@
 #include "core/keep/BlackCarrying.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <iterator>
 #include <limits>
+#include <map>
 #include <set>
 
 namespace cadrel::core {
@@ -43,6 +45,46 @@ struct IslandEdges {
             shiftsAtLast.push_back(shift);
         last = std::max(last, source.end);
     }
+};
+
+/// Ranges out of which others are taken, in no more time than what they meet takes.
+class Leftover {
+public:
+    explicit Leftover(const FrameRanges& ranges)
+    {
+        for (const FrameRange& range : ranges)
+            m_ends.emplace_hint(m_ends.end(), range.start, range.end);
+    }
+
+    FrameRanges within(const FrameRange& bounds) const
+    {
+        FrameRanges found;
+        auto range = m_ends.upper_bound(bounds.start);
+        if (range != m_ends.begin())
+            --range;
+        for (; range != m_ends.end() && range->first < bounds.end; ++range) {
+            const FrameRange part = intersect({range->first, range->second}, bounds);
+            if (!part.isEmpty())
+                found.push_back(part);
+        }
+        return found;
+    }
+
+    void take(const FrameRange& taken)
+    {
+        for (const FrameRange& part : within(taken)) {
+            const auto place = std::prev(m_ends.upper_bound(part.start));
+            const FrameRange whole{place->first, place->second};
+            m_ends.erase(place);
+            if (whole.start < part.start)
+                m_ends.emplace(whole.start, part.start);
+            if (part.end < whole.end)
+                m_ends.emplace(part.end, whole.end);
+        }
+    }
+
+private:
+    std::map<std::int32_t, std::int32_t> m_ends; ///< by the start
 };
 
 } // namespace
@@ -130,13 +172,13 @@ void BlackCarrying::carryAroundReels()
 
 void BlackCarrying::carryAsChanged(const std::vector<ChangeStretch>& changes)
 {
-    FrameRanges left = lost();
+    Leftover left(lost());
     for (const ChangeStretch& stretch : changes) {
-        const FrameRanges found = within(stretch.source(), left);
-        for (const FrameRange& range : found)
+        const std::size_t placedBefore = m_placed.size();
+        for (const FrameRange& range : left.within(stretch.source()))
             carry(range, stretch.shift, AllTime);
-        if (!found.empty())
-            left = lost();
+        for (std::size_t index = placedBefore; index < m_placed.size(); ++index)
+            left.take(m_placed[index].source());
     }
 }
 

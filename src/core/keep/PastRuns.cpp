@@ -13,6 +13,7 @@
 #include "util/Result.h"
 
 #include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace cadrel::core {
@@ -86,62 +87,92 @@ std::optional<std::int32_t> differenceOfRepeatedRun(const PictureLine& began, co
     return isGivenAgain && !differences.empty() ? std::optional(differences.front().start) : std::nullopt;
 }
 
+FrameRanges common(const FrameRanges& a, const FrameRanges& b)
+{
+    return without(a, without(a, b));
+}
+
+std::optional<std::int32_t> firstDifferenceIn(const FrameRanges& ranges, const PictureLine& standing,
+                                              const PictureLine& given)
+{
+    const PictureComparison comparison(standing, given);
+    for (const FrameRange& range : ranges) {
+        const FrameRanges differences = comparison.differencesUnder(0, range);
+        if (!differences.empty())
+            return differences.front().start;
+    }
+    return std::nullopt;
+}
+
+/// What the bytes begin with: that they are of this class, and how they are written.
+constexpr std::uint32_t BytesVersion = 0x52550001;
+
 } // namespace
 
-void PastRuns::add(const EventList& oldCut, const EventList& newCut, const EventList& changes)
+void PastRuns::add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+                   const FrameRange& allowed)
 {
-    Run run = runOf(oldCut, newCut, changes);
+    Run run = runOf(oldCut, newCut, changes, allowed);
     if (!run.isOfCuts() && run.changes.isEmpty())
         return;
     forgetWithin(run.extent);
     m_runs.push_back(std::move(run));
 }
 
-void PastRuns::forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes)
+void PastRuns::forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+                              const FrameRange& allowed)
 {
-    forgetWithin(runOf(oldCut, newCut, changes).extent);
+    forgetWithin(runOf(oldCut, newCut, changes, allowed).extent);
 }
 
 void PastRuns::forgetWithin(const FrameRanges& extent)
 {
-    std::erase_if(m_runs, [&extent](const Run& run) { return without(run.extent, extent).empty(); });
+    std::erase_if(m_runs, [&extent](const Run& run) { return without(run.left, extent).empty(); });
 }
 
-PastRuns::Run PastRuns::runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes) const
+PastRuns::Run PastRuns::runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+                              const FrameRange& allowed) const
 {
-    Run run{oldCut, newCut, EventList(), {}};
+    Run run{oldCut, newCut, EventList(), allowed, {}, {}};
     if (!run.isOfCuts()) {
         run.changes = changes;
-        run.extent = hullOf(changes, m_context.framerate);
+        run.extent = within(allowed, hullOf(changes, m_context.framerate));
+        run.left = run.extent;
         return run;
     }
     PictureNames names(m_context.matchBy, m_context.vfxPatterns);
     const PictureLine oldLine(oldCut, names, m_context.framerate);
     const PictureLine newLine(newCut, names, m_context.framerate);
-    run.extent = reelsOf(both(oldLine.lit(), newLine.lit()), m_context.framerate);
+    run.extent = within(allowed, reelsOf(both(oldLine.lit(), newLine.lit()), m_context.framerate));
+    run.left = both(within(allowed, reelsOf(newLine.lit(), m_context.framerate)),
+                    without(reelsOf(oldLine.lit(), m_context.framerate), {allowed}));
+    if (run.left.empty())
+        run.left = run.extent;
     return run;
 }
 
-std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut) const
+std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut, const FrameRanges& asked) const
 {
     const Framerate& framerate = m_context.framerate;
     PictureNames names(m_context.matchBy, m_context.vfxPatterns);
     const PictureLine given(asStored(oldCut), names, framerate);
-    const FrameRanges givenReels = reelsOf(given.lit(), framerate);
+    const FrameRanges givenReels = common(reelsOf(given.lit(), framerate), asked);
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend(); ++run) {
         if (run->isOfCuts()) {
             const PictureLine began(asStored(run->oldCut), names, framerate);
             const PictureLine standing(asStored(run->newCut), names, framerate);
-            const PictureComparison comparison(standing, given);
-            for (const FrameRange& reel : reelsOf(standing.lit(), framerate)) {
-                for (const FrameRange& common : without(within(reel, givenReels), hidden)) {
-                    const FrameRanges differences = comparison.differencesUnder(0, common);
-                    if (!differences.empty())
-                        return differences.front().start;
-                }
-            }
-            for (const FrameRange& reel : without(run->extent, hidden)) {
+            const FrameRanges changed = common(within(run->allowed, reelsOf(standing.lit(), framerate)), givenReels);
+            const FrameRanges unchanged = common(without(reelsOf(began.lit(), framerate), {run->allowed}), givenReels);
+            if (const auto difference = firstDifferenceIn(without(changed, hidden), standing, given))
+                return difference;
+            // Where a run could change nothing, an earlier one may have.
+            FrameRanges elsewhere = hidden;
+            for (auto earlier = std::next(run); earlier != m_runs.rend(); ++earlier)
+                elsewhere = both(std::move(elsewhere), earlier->extent);
+            if (const auto difference = firstDifferenceIn(without(unchanged, elsewhere), began, given))
+                return difference;
+            for (const FrameRange& reel : common(without(run->extent, hidden), asked)) {
                 if (const auto difference = differenceOfRepeatedRun(began, standing, given, reel))
                     return difference;
             }
@@ -166,19 +197,19 @@ EventList PastRuns::changesOf(const Run& run) const
     return changes;
 }
 
-bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven) const
+bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven, const FrameRange& allowed) const
 {
     const std::vector<ChangeStretch> stretches = stretchesOf(changes, m_context.framerate);
-    const FrameRanges hull = hullOf(changes, m_context.framerate);
+    const FrameRanges hull = within(allowed, hullOf(changes, m_context.framerate));
     const bool movesAnything = std::any_of(stretches.begin(), stretches.end(),
                                            [](const ChangeStretch& stretch) { return stretch.shift != 0; });
     if (!movesAnything)
         return false;
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend() && without(hull, hidden) == hull; ++run) {
-        const std::vector<ChangeStretch> others = isGiven || !run->isOfCuts()
-                                                      ? stretchesOf(changesOf(*run), m_context.framerate)
-                                                      : std::vector<ChangeStretch>();
+        const bool isComparable = (isGiven || !run->isOfCuts()) && !within(allowed, run->extent).empty();
+        const std::vector<ChangeStretch> others =
+            isComparable ? stretchesOf(changesOf(*run), m_context.framerate) : std::vector<ChangeStretch>();
         if (std::equal(stretches.begin(), stretches.end(), others.begin(), others.end(), isSame))
             return true;
         hidden = both(std::move(hidden), run->extent);
@@ -189,9 +220,10 @@ bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven) const
 std::string PastRuns::toBytes() const
 {
     ByteArchive archive;
+    archive << BytesVersion;
     archive.writeCount(m_runs.size());
     for (const Run& run : m_runs)
-        archive << run.oldCut << run.newCut << run.changes;
+        archive << run.oldCut << run.newCut << run.changes << run.allowed.start << run.allowed.end;
     return {archive.data(), archive.data() + archive.size()};
 }
 
@@ -201,12 +233,17 @@ void PastRuns::read(const std::string& bytes)
     archive.assign(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
     m_runs.clear();
     try {
+        std::uint32_t version = 0;
+        archive >> version;
+        if (version != BytesVersion)
+            return;
         for (std::size_t count = archive.readCount(); count > 0; --count) {
             EventList oldCut;
             EventList newCut;
             EventList changes;
-            archive >> oldCut >> newCut >> changes;
-            add(oldCut, newCut, changes);
+            FrameRange allowed;
+            archive >> oldCut >> newCut >> changes >> allowed.start >> allowed.end;
+            add(oldCut, newCut, changes, allowed);
         }
     } catch (Result::Type) {
         m_runs.clear();

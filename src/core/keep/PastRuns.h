@@ -9,6 +9,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <limits>
 #include <optional>
 #include <string>
 #include <vector>
@@ -32,21 +33,28 @@ public:
 
     explicit PastRuns(Context context) : m_context(std::move(context)) {}
 
+    /// A stretch without bounds, for a run that may change all.
+    static constexpr FrameRange AllTime{std::numeric_limits<std::int32_t>::min(),
+                                        std::numeric_limits<std::int32_t>::max()};
+
     /// A run after those before it; the lists are as the model had them. Without both cuts it is one of a change EDL that
-    /// was given. A run without events is none. Shares the events.
-    void add(const EventList& oldCut, const EventList& newCut, const EventList& changes);
+    /// was given. A run without events is none. Outside of `allowed` it changed nothing, so that the sound stands in the
+    /// old cut there. Shares the events.
+    void add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+             const FrameRange& allowed = AllTime);
     /// Forgets the runs that such a run would hide altogether.
-    void forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes);
+    void forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+                        const FrameRange& allowed = AllTime);
 
     bool isEmpty() const { return m_runs.empty(); }
     std::size_t size() const { return m_runs.size(); }
 
     /// The first frame at which the sound stands in another cut than the one given: at which the two differ where both
-    /// have a reel, or where they end when a run began with just the cut that is given.
-    std::optional<std::int32_t> firstDifference(const EventList& oldCut) const;
-    /// Whether a run has carried out this change EDL; one that moves nothing counts as none. A list that was `given` is
-    /// compared with all runs, and one that was made of two cuts only with those of given lists.
-    bool haveCarriedOut(const EventList& changes, bool isGiven) const;
+    /// have a reel, or where they end when a run began with just the cut that is given. Only frames in `asked` count.
+    std::optional<std::int32_t> firstDifference(const EventList& oldCut, const FrameRanges& asked = {AllTime}) const;
+    /// Whether a run has carried out this change EDL in some of `allowed`; one that moves nothing counts as none. A list
+    /// that was `given` is compared with all runs, and one that was made of two cuts only with those of given lists.
+    bool haveCarriedOut(const EventList& changes, bool isGiven, const FrameRange& allowed = AllTime) const;
 
     /// For the model's properties. The reader takes what isn't such bytes for no runs.
     std::string toBytes() const;
@@ -57,12 +65,15 @@ private:
         EventList oldCut;
         EventList newCut;
         EventList changes;
-        FrameRanges extent; ///< the reels of both cuts, or the hull of the change EDL
+        FrameRange allowed;
+        FrameRanges extent; ///< the reels of both cuts, or the hull of the change EDL, within `allowed`
+        FrameRanges left;   ///< the reels that the sound stands in after the run, or the hull likewise
 
         bool isOfCuts() const { return !oldCut.isEmpty() || !newCut.isEmpty(); }
     };
 
-    Run runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes) const;
+    Run runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+              const FrameRange& allowed) const;
     void forgetWithin(const FrameRanges& extent);
     EventList changesOf(const Run& run) const;
 

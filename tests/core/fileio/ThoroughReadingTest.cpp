@@ -243,10 +243,76 @@ TEST_F(ThoroughReading, AShotOfANegativeSpeedIsReversed)
 {
     EXPECT_EQ(Reading(Cut + "\nM2   AX       -25.0    01:00:00:00\n").rolls(), Lines{"-AX"});
     EXPECT_EQ(Reading(Cut + "\n* FROM CLIP NAME: A\nM2 AX -025 \n").rolls(), Lines{"-AX"});
-    EXPECT_EQ(Reading(Cut + "\nM2\tLONGER NAME OF AX\t-25.0\t01:00:00:00\n").rolls(), Lines{"-AX"});
+    EXPECT_EQ(Reading(Cut + "\nM2\tAX\t-25.0\t01:00:00:00\n").rolls(), Lines{"-AX"});
+    EXPECT_EQ(Reading(Cut + "\nM2   -25.0    01:00:00:00\n").rolls(), Lines{"-AX"}) << "no roll is told";
     EXPECT_EQ(Reading(Cut + "\nM2   AX       025.0    01:00:00:00\n").rolls(), Lines{"AX"});
     EXPECT_EQ(Reading(Cut + "\nM2   AX       -00.0    01:00:00:00\n").rolls(), Lines{"AX"});
     EXPECT_EQ(Reading(Cut + "\n002 BX V C " + Timecodes + "\nM2 BX -25.0 01:00:00:00").rolls(), (Lines{"AX", "-BX"}));
+}
+
+TEST_F(ThoroughReading, AMotionLineOfAnotherRollReversesNothing)
+{
+    const Reading reading(Cut + "\nM2 BX -25.0 01:00:00:00");
+
+    EXPECT_EQ(reading.rolls(), Lines{"AX"});
+    EXPECT_EQ(reading.unread(), Lines{"2: plays no event backwards, since none of its roll stands before it"});
+}
+
+TEST_F(ThoroughReading, WhatFollowsAnEventThatIsNotReadBelongsToNoOther)
+{
+    const std::string own = "\n* FROM CLIP NAME: ONE\n";
+    const std::string further = "\n* FROM CLIP NAME: TWO\nM2 AX -25.0 01:00:00:00\n";
+    const std::string next = "003 CX V C " + Timecodes + "\n* FROM CLIP NAME: THREE\n";
+    const std::string line = "002 AX V C " + Timecodes;
+    const std::string missing = line.substr(0, line.rfind(' '));
+    for (const std::string& unread : Lines{"O" + line, missing, "\x01 " + line, "* REMARK " + line}) {
+        SCOPED_TRACE(unread);
+
+        const Reading reading(Cut + own + unread + further + next);
+
+        EXPECT_EQ(reading.rolls(), (Lines{"AX", "CX"}));
+        EXPECT_EQ(reading.events.at(0).clipName(), "ONE");
+        EXPECT_EQ(reading.events.at(1).clipName(), "THREE");
+        ASSERT_EQ(reading.unread().size(), 2U);
+        EXPECT_EQ(reading.unread().back(), "5: plays no event backwards, since none of its roll stands before it");
+    }
+}
+
+TEST_F(ThoroughReading, WhatFollowsASecondEventInALineBelongsToNone)
+{
+    const Reading reading(Cut + " 002 AX V C " + Timecodes + "\n* FROM CLIP NAME: TWO\nM2 AX -25.0");
+
+    EXPECT_EQ(reading.rolls(), Lines{"AX"});
+    EXPECT_EQ(reading.events.at(0).clipName(), "");
+    EXPECT_EQ(reading.unread(), (Lines{"1: holds a second event, which isn't read",
+                                       "3: plays no event backwards, since none of its roll stands before it"}));
+}
+
+TEST_F(ThoroughReading, AnEventAfterACommentInItsLineSpoilsTheName)
+{
+    const Reading reading(Cut + "\n* FROM CLIP NAME: ONE002 BX V C " + Timecodes + "\n* FROM CLIP NAME: TWO");
+
+    EXPECT_EQ(reading.rolls(), Lines{"AX"});
+    EXPECT_EQ(reading.events.at(0).clipName(), "");
+    EXPECT_EQ(reading.unread(), Lines{"2: holds an event in a comment, which isn't read"});
+}
+
+TEST_F(ThoroughReading, AnEventLineThatWasMadeACommentTakesNoLines)
+{
+    const Reading reading(Cut + "\n* 002 BX V C " + Timecodes + "\n* FROM CLIP NAME: ONE\n");
+
+    EXPECT_EQ(reading.events.at(0).clipName(), "ONE");
+    EXPECT_EQ(reading.unread(), Lines{});
+}
+
+TEST_F(ThoroughReading, TellsANameOrAMotionAfterTheEventInItsLine)
+{
+    const Lines told{"1: holds a clip name or a motion after the event, which isn't read"};
+
+    EXPECT_EQ(unreadOf(Cut + " * FROM CLIP NAME: ONE"), told);
+    EXPECT_EQ(unreadOf(Cut + " M2 AX -25.0 01:00:00:00"), told);
+    EXPECT_EQ(unreadOf(Cut + " * SOURCE FILE: ONE"), Lines{});
+    EXPECT_EQ(unreadOf(Cut + " M25"), Lines{});
 }
 
 TEST_F(ThoroughReading, InATransitionTheRollTellsWhichShotIsReversed)

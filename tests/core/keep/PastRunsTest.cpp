@@ -141,16 +141,80 @@ TEST_F(PastRunsTest, StretchesThatGoOnAlikeCountAsOne)
     EXPECT_TRUE(m_runs.haveCarriedOut(tenSecondsMovedTo("00:10:05:00", "00:10:15:00"), true));
 }
 
+TEST_F(PastRunsTest, OutsideOfWhatARunCouldChangeTheSoundStandsInItsOldCut)
+{
+    const Film before = reelAt(1000);
+    const Film after = Film().at(1000).shot("X", 0, 100).shot("Y", 0, 50);
+    m_runs.add(before.list(), after.list(), EventList(), {1000, 1100});
+
+    // The first half stands in the new cut, and the second in the old one.
+    EXPECT_EQ(m_runs.firstDifference(before.list()), 1000);
+    EXPECT_EQ(m_runs.firstDifference(after.list()), 1100);
+    EXPECT_EQ(m_runs.firstDifference(Film().at(1000).shot("X", 0, 100).shot("B", 0, 50).list()), std::nullopt);
+    // The rest of the same change doesn't ask for the first half.
+    EXPECT_EQ(m_runs.firstDifference(before.list(), {{1100, 1150}}), std::nullopt);
+    EXPECT_EQ(m_runs.firstDifference(before.list(), {{1099, 1150}}), 1099);
+
+    m_runs.add(before.list(), after.list(), EventList(), {1100, 1150});
+    EXPECT_EQ(m_runs.firstDifference(after.list()), std::nullopt);
+    EXPECT_EQ(m_runs.firstDifference(before.list()), 1100);
+}
+
+TEST_F(PastRunsTest, AChangeEdlMayBeCarriedOutWhereNoRunCouldChangeAnything)
+{
+    const EventList changes = tenSecondsMovedTo("00:10:05:00", "00:10:15:00"); // frames 600 to 615
+    m_runs.add(EventList(), EventList(), changes, {600, 608});
+
+    EXPECT_TRUE(m_runs.haveCarriedOut(changes, true));
+    EXPECT_TRUE(m_runs.haveCarriedOut(changes, true, {607, 615}));
+    EXPECT_FALSE(m_runs.haveCarriedOut(changes, true, {608, 615}));
+}
+
+TEST_F(PastRunsTest, OfAFilmThatGetsShorterTheLastRunAloneIsKept)
+{
+    for (std::int32_t length = 50; length > 40; --length)
+        carryOver(Film().at(1000).shot("A", 0, length), Film().at(1000).shot("A", 0, length - 1));
+
+    EXPECT_EQ(m_runs.size(), 1U);
+    EXPECT_EQ(differenceTo(Film().at(1000).shot("A", 0, 40)), std::nullopt);
+    EXPECT_EQ(differenceTo(Film().at(1000).shot("A", 0, 41)), 1040);
+}
+
+TEST_F(PastRunsTest, ARestrictedRunIsKeptUntilWhatItHasLeftIsHidden)
+{
+    m_runs.add(reelAt(1000).list(), reelAt(1000).list(), EventList(), {1000, 1100});
+    m_runs.add(reelAt(1000).list(), reelAt(1000).list(), EventList(), {1000, 1149});
+    EXPECT_EQ(m_runs.size(), 2U);
+
+    m_runs.add(reelAt(1000).list(), reelAt(1000).list(), EventList(), {1000, 1150});
+    EXPECT_EQ(m_runs.size(), 1U);
+}
+
+TEST_F(PastRunsTest, BytesOfAnotherVersionAreNoRuns)
+{
+    carryOver(reelAt(1000), reelAt(1000));
+    std::string bytes = m_runs.toBytes();
+    ++bytes.front();
+
+    PastRuns read({0, {}, FrameASecond});
+    read.read(bytes);
+
+    EXPECT_TRUE(read.isEmpty());
+}
+
 TEST_F(PastRunsTest, RunsReadBackFromTheirBytesSayTheSame)
 {
     carryOver(reelAt(1000), reelAt(1000).shot("C", 0, 10));
     carryOut(tenSecondsMovedTo("00:10:05:00", "00:10:15:00"));
+    m_runs.add(reelAt(3000).list(), Film().at(3000).shot("X", 0, 150).list(), EventList(), {3000, 3050});
 
     PastRuns read({0, {}, FrameASecond});
     read.read(m_runs.toBytes());
 
-    EXPECT_EQ(read.size(), 2U);
+    EXPECT_EQ(read.size(), 3U);
     EXPECT_EQ(read.firstDifference(reelAt(1000).list()), 1150);
+    EXPECT_EQ(read.firstDifference(reelAt(3000).list()), 3000);
+    EXPECT_EQ(read.firstDifference(Film().at(3000).shot("X", 0, 150).list()), 3050);
     EXPECT_TRUE(read.haveCarriedOut(tenSecondsMovedTo("00:10:05:00", "00:10:15:00"), true));
     EXPECT_EQ(read.toBytes(), m_runs.toBytes());
 }
