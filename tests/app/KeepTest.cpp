@@ -6,7 +6,6 @@
 #include "tests/app/ProgramRun.h"
 #include "tests/app/StoredProjects.h"
 #include "tests/support/TreePaths.h"
-#include "tests/support/core/TreeEdls.h"
 
 #include <algorithm>
 #include <array>
@@ -161,35 +160,6 @@ json soundOfThreeShots()
     return json::array({audioTrack("DIA", {clip("pop", Hour - 2, Hour - 1), clip("a", Hour, Hour + 10),
                                            clip("b", Hour + 10, Hour + 20), clip("c", Hour + 20, Hour + 30),
                                            clip("tail", Hour + 31, Hour + 33)})});
-}
-
-TEST(Keep, EveryEdlOfTheTreeOntoItselfChangesNoTrackOfAnyProject)
-{
-    const TempFolder folder;
-    std::uint64_t seed = 1;
-    std::size_t applied = 0;
-    for (const std::string& path : treeEdls()) {
-        SCOPED_TRACE(path);
-        const TreeEdl edl(path);
-        if (!edl.events().hasReadableEvent())
-            continue;
-        const auto project = folder.write("random.stage", randomProjectText(seed++, edl.framerate()));
-        const auto result = folder / "result.stage";
-
-        const Outcome outcome = runCadrel({"apply", project, "--old", treePath(path), "--new", treePath(path),
-                                           "--force", "-o", result, "--json", "-"});
-
-        if (outcome.status != 0) {
-            // What can't be generated is refused, and so changes nothing either.
-            EXPECT_FALSE(std::filesystem::exists(result)) << outcome.err;
-            continue;
-        }
-        ++applied;
-        EXPECT_FALSE(json::parse(outcome.out).at("runNeeded").get<bool>());
-        EXPECT_EQ(tracksIn(result), tracksIn(project));
-        std::filesystem::remove(result);
-    }
-    EXPECT_GT(applied, 15U);
 }
 
 TEST(Keep, ACutOntoItselfStoresTheModelAlone)
