@@ -1097,9 +1097,9 @@ TEST(Apply, BeginningAnewForgetsTheLastCut)
 TEST(Apply, AClipDecadesAfterTheFilmIsNamed)
 {
     const Scene scene;
-    // 31 years of 365 days are 271,560 hours.
-    const std::string far = number(271560 * 3600.0);
-    const std::string later = number(271560 * 3600.0 + 1.0);
+    // A project reaches to 1,000,000,000 seconds, nearly 32 years. The first whole day past this clip is past that.
+    const std::string far = number(277777 * 3600.0);
+    const std::string later = number(277777 * 3600.0 + 1.0);
     const auto failureOf = [&](const std::string& track) {
         const std::string project = scene.folder.write("far.stage", projectWith(track));
         const Outcome outcome =
@@ -1113,7 +1113,7 @@ TEST(Apply, AClipDecadesAfterTheFilmIsNamed)
 
     EXPECT_EQ(failureOf(R"({"kind": "audio", "name": "DIA", "events": [)" + near + R"(, {"kind": "clip", "start": )" +
                         far + R"(, "end": )" + later + R"(, "name": "far"}]})"),
-              "the clip \"far\" on the track \"DIA\" stands at 271560:00:00:00" + remedy);
+              "the clip \"far\" on the track \"DIA\" stands at 277777:00:00:00" + remedy);
 }
 
 TEST(Apply, LinesThatCannotBeReadAreToldAndStrictWritesNothing)
