@@ -313,7 +313,8 @@ FrameRanges sourcesOf(const DataModel& model, const KeptRun* kept)
 /// The frames of the new programme that a run with these settings may change.
 core::FrameRange allowedFrames(const Settings& settings)
 {
-    if (!settings.restrictRange())
+    // A stored range that makes no sense is the next run's to refuse, if it still has it then.
+    if (!settings.restrictRange() || !(settings.preserveMaterialBefore() <= settings.preserveMaterialAfter()))
         return core::PastRuns::AllTime;
     const FrameRanges frames = core::framesOfMaterial(
         {{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()}}, Timecode::framerate());
@@ -485,7 +486,7 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
         return options.replacing.keepsFormer ? std::vector{file} : std::vector<std::string>();
     };
     Backups formerProject(namesToKeep(target));
-    Backups formerReport(namesToKeep(options.jsonFile));
+    Backups formerReport(namesToKeep(Output::isFile(options.jsonFile) ? options.jsonFile : std::string()));
     facts.projectBackups = formerProject.names();
     facts.reportBackups = formerReport.names();
     std::optional<Output> report;

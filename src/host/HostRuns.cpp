@@ -60,8 +60,9 @@ private:
 int32 Host::onIdle()
 {
     resultOf([this] { m_videoProvider->poll(); });
-    // A progress window that lets idle calls through doesn't begin a second run within the first.
-    if (isBusy())
+    // A progress window that lets idle calls through doesn't begin a second run within the first, nor does a named change
+    // that goes on: what is requested is done on a later call, as an entry of its own.
+    if (isBusy() || (m_currentProject && namedEdit(m_currentProject->document())))
         return ResultOk;
     if (m_runRequested)
         serve(Action::Run, m_runRequested, [this] { return runCadrel(); });

@@ -87,8 +87,9 @@ int32 HostWindow::resizeView(IPlugView* view, const ViewRect& rect)
 {
     if (!m_native || view != m_view.get() || !m_description.isResizable || widthOf(rect) <= 0 || heightOf(rect) <= 0)
         return ResultFalse;
+    const Counted<IPlugView> held = m_view;
     m_native->setSize(widthOf(rect), heightOf(rect));
-    return m_view->onSize({0, 0, widthOf(rect), heightOf(rect)});
+    return held->onSize({0, 0, widthOf(rect), heightOf(rect)});
 }
 
 void HostWindow::resizedByUser(int32 width, int32 height)

@@ -76,6 +76,21 @@ TEST_P(HostNamedEditTest, DeletesThePreviewRangeInTheEntryOfTheChange)
     EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
 }
 
+TEST_P(HostNamedEditTest, BeginsNoRunWhileTheChangeGoesOn)
+{
+    ASSERT_EQ(adapter().startCadrel(), Result::Ok);
+    {
+        const auto command = adapter().createCommand(L"Edit Event");
+        host.idle();
+        EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    }
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Edit Event"}));
+
+    host.idle();
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Edit Event", u"Apply Cadrel"}));
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
 TEST_P(HostNamedEditTest, LeavesTheChangeOpenWhenTheEndOfThePreviewFails)
 {
     previewAll();

@@ -21,8 +21,8 @@ class VideoProvider;
 /// The controller of the module: the object that the factory makes. It enters the module's command into the host's "Project"
 /// menu, opens the one window, and owns Host.
 ///
-/// Host is made at the first initialize() that succeeds and lasts until the controller goes. What is registered with the host, and JUCE,
-/// last from an initialize() that succeeded to the next terminate(), or to the end of the controller.
+/// Host is made at the first initialize() that succeeds and lasts until the controller goes. What is registered with the
+/// host, and JUCE, last from an initialize() that succeeded to the next terminate(), or to the end of the controller.
 class Cadrel final : public Velmark::Implements<Cadrel, Velmark::FObject, Velmark::IPluginBase, Velmark::IActionHandler,
                                                 Velmark::IViewBuilder, Velmark::IPlugController,
                                                 Velmark::ICloseWindowNotification, Velmark::IPlugWindowFactory> {

@@ -132,6 +132,8 @@ int32 JuceGuiAdapter::removed()
 
 int32 JuceGuiAdapter::idle()
 {
+    // A host may give the view back in the midst of it.
+    const auto self = Counted<JuceGuiAdapter>::share(this);
     return resultOf([&] {
         if (m_unusedKeys)
             m_unusedKeys->beginServing();

@@ -37,7 +37,10 @@ DataModelChangeCommand::DataModelChangeCommand(IEditTransaction& transaction,
 DataModelChangeCommand::~DataModelChangeCommand()
 {
     m_transaction->addStep(m_step.get());
-    if (m_namedEdit)
+    const bool isNamed = m_namedEdit != nullptr;
+    // Whoever is told of the commit begins an edit of his own.
+    m_namedEdit.reset();
+    if (isNamed)
         m_transaction->commit(m_project.get(), util::HostString(m_name).utf16());
 }
 
