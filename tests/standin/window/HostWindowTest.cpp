@@ -36,6 +36,13 @@ private:
 
 class HostWindowTest : public testing::Test {
 protected:
+    // An open window and its view hold one another.
+    ~HostWindowTest() override
+    {
+        if (m_window)
+            m_window->show(false);
+    }
+
     void make(bool isResizable = true)
     {
         auto view = makeCounted<FakeView>(m_windows.calls);
