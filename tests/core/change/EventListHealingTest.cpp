@@ -6,6 +6,7 @@
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
 #include "tests/core/change/AmpleTime.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/EventMaking.h"
 #include "tests/support/core/RecordingListener.h"

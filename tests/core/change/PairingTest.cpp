@@ -7,6 +7,7 @@
 #include "core/time/Timecode.h"
 #include "tests/core/change/AmpleTime.h"
 #include "tests/core/change/PairwiseGenerator.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/core/EventMaking.h"
 #include "tests/support/core/TestProject.h"
 #include "util/Result.h"

@@ -18,6 +18,14 @@ namespace cadrel::tests {
 
 namespace {
 
+/// Names a server that can't exist, so that nothing reaches one by chance: without a name JUCE takes the first of the machine,
+/// which may be that of another test.
+bool hideOtherScreens()
+{
+    return setenv("DISPLAY", ":65000", 1) == 0;
+}
+const bool areOthersHidden = hideOtherScreens();
+
 /// The server writes its number when it is ready.
 std::string readLine(int descriptor)
 {
@@ -57,7 +65,7 @@ VirtualScreen::VirtualScreen(int width, int height)
 
 VirtualScreen::~VirtualScreen()
 {
-    unsetenv("DISPLAY");
+    hideOtherScreens();
     kill(m_server, SIGTERM);
     waitpid(m_server, nullptr, 0);
 }

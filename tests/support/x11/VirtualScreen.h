@@ -9,7 +9,7 @@
 namespace cadrel::tests {
 
 /// An X server of its own for one test, without a window manager, with a screen of 1600 x 1000 unless told otherwise. While
-/// it lives, the environment names it as the display of this process.
+/// it lives, the environment names it as the display of this process. Without one, the process sees no server at all.
 class VirtualScreen {
 public:
     /// Throws std::runtime_error when the server doesn't start.
