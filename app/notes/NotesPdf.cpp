@@ -35,6 +35,7 @@ constexpr PdfColour Moved{0.83, 0.54, 0.12, 0.7};
 constexpr PdfColour Doubled{0.54, 0.36, 0.75, 0.7};
 constexpr PdfColour Lifted{0.78, 0.27, 0.23};
 constexpr PdfColour Inserted{0.18, 0.58, 0.38};
+constexpr PdfColour Version{0.23, 0.47, 0.77};
 
 constexpr PdfFont TitleFont{"sans-serif", 19, true};
 constexpr PdfFont HeadingFont{"sans-serif", 12, true};
@@ -81,10 +82,16 @@ private:
     void addText(const std::string& text, const PdfFont& font, const PdfColour& colour, double height,
                  bool goesWithNext = false)
     {
+        const std::vector<std::string> lines = m_pages.wrapped(text, font, m_right - Margin);
+        const double leading = font.size * 1.4;
         add(
-            height,
-            [this, text, font, colour, height](PdfPages& pages, double top) {
-                pages.text(Margin, top + height - 4, pages.fitting(text, font, m_right - Margin), font, colour);
+            height + static_cast<double>(lines.size() - 1) * leading,
+            [lines, font, colour, height, leading](PdfPages& pages, double top) {
+                double y = top + height - 4;
+                for (const std::string& line : lines) {
+                    pages.text(Margin, y, line, font, colour);
+                    y += leading;
+                }
             },
             goesWithNext);
     }
@@ -164,12 +171,12 @@ private:
             return;
         }
         const core::NoteStep& step = *entry.step();
-        if (!drawsMoves || step.action != core::StepAction::Replace)
+        if (!drawsMoves || step.action == core::StepAction::Move)
             return;
         for (const FrameSpan& removed : step.removedFrames)
             drawBox(removed, oldTop, Lifted);
         if (step.inserted.length > 0)
-            drawBox(step.inserted, newTop, Inserted);
+            drawBox(step.inserted, newTop, step.action == core::StepAction::Relabel ? Version : Inserted);
         for (const PictureChange& change : step.changes) {
             if (change.kind == core::ChangeKind::Doubled)
                 drawBand(*change.inOld, *change.inNew, bandTop, Doubled);

@@ -34,21 +34,20 @@ std::string trimmedEnd(std::string line)
     return line + "\n";
 }
 
-/// Broken at blanks where it is too long; the further lines are indented.
-std::string wrapped(const std::string& text, const std::string& indent)
+/// Broken at blanks where it is too long; the further lines are indented by more.
+std::string wrapped(const std::string& text)
 {
-    std::string lines;
-    std::string line;
     const auto widthOf = [](const std::string& part) { return toPrintable(part).width; };
+    std::string lines;
+    std::string line = " ";
     for (std::size_t start = 0; start <= text.size();) {
         const std::size_t end = std::min(text.find(' ', start), text.size());
         const std::string word = text.substr(start, end - start);
-        if (!line.empty() && widthOf(line) + 1 + widthOf(word) > Width) {
+        if (widthOf(line) + 1 + widthOf(word) > Width) {
             lines += line + "\n";
-            line = indent + word;
-        } else {
-            line += (line.empty() ? "" : " ") + word;
+            line = std::string(3, ' ');
         }
+        line.append(" ").append(word);
         start = end + 1;
     }
     return lines + line + "\n";
@@ -141,7 +140,7 @@ private:
             return {};
         std::string text = "\nHealed, doubted and passed over\n";
         for (const std::string& line : lines)
-            text += wrapped("  " + line, "    ");
+            text += wrapped(line);
         return text;
     }
 

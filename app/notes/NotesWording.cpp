@@ -30,22 +30,17 @@ namespace {
 
 constexpr std::int32_t FramesPerFoot = 16;
 constexpr std::size_t MostCharactersOfAName = 39;
-/// So many events with the same doubt are named.
-constexpr std::size_t MostOfOneDoubt = 5;
+/// So many events with the same doubt are named, and so many lines that were not read.
+constexpr std::size_t MostOfAKind = 5;
 
 constexpr std::array<std::string_view, 12> KindWords{
     "head-trimmed", "tail-trimmed", "lifted",          "inserted",         "replaced",           "moved",
     "doubled",      "retimed",      "version-changed", "transition-added", "transition-removed", "transition-changed"};
 constexpr std::array<std::string_view, 3> ActionWords{"replace", "move", "relabel"};
 constexpr std::array<std::string_view, 5> DoubtWords{"no-picture", "flawed", "reversed", "nameless", "covered"};
-constexpr std::array<std::string_view, 13> FlawWords{
-    "timecode-uninitialized", "free-text",        "event-number-not-numeric", "roll-name-invalid",  "not-video-event",
-    "transition-duration",    "transition-type",  "src-in-unreadable",        "src-out-unreadable", "dst-in-unreadable",
-    "dst-out-unreadable",     "timecode-invalid", "timecode-range-invalid"};
 static_assert(static_cast<std::size_t>(ChangeKind::TransitionChanged) + 1 == KindWords.size());
 static_assert(static_cast<std::size_t>(StepAction::Relabel) + 1 == ActionWords.size());
 static_assert(static_cast<std::size_t>(PictureDoubt::Covered) + 1 == DoubtWords.size());
-static_assert(core::EventFlaw::Last + 1 == FlawWords.size());
 
 /// "-20 frames", "+1 frame".
 std::string signedFrames(std::int32_t frames)
@@ -90,11 +85,6 @@ std::string_view wordOf(StepAction action)
 std::string_view wordOf(PictureDoubt doubt)
 {
     return DoubtWords.at(static_cast<std::size_t>(doubt));
-}
-
-std::string_view wordOfFlaw(std::int32_t flaw)
-{
-    return FlawWords.at(static_cast<std::size_t>(flaw));
 }
 
 std::string concatenated(std::initializer_list<std::string_view> texts)
@@ -288,9 +278,28 @@ std::vector<std::string> NotesWording::remarks() const
     if (const std::size_t joined = m_document.notes.joinedSteps(); joined > 0)
         lines.push_back(std::to_string(joined) + " trims that cancel out within " +
                         counted(static_cast<std::size_t>(m_document.simplify), "frame") + " are joined");
-    addDoubts(false, lines);
-    addDoubts(true, lines);
+    for (const bool isNew : {false, true}) {
+        addDoubts(isNew, lines);
+        addUnread(isNew, lines);
+    }
     return lines;
+}
+
+void NotesWording::addUnread(bool isNew, std::vector<std::string>& lines) const
+{
+    const std::vector<UnreadOfFile>& unread = isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread;
+    std::size_t count = 0;
+    for (const auto& [file, unreadLines] : unread) {
+        for (const auto& [line, problem] : unreadLines) {
+            if (++count <= MostOfAKind)
+                lines.push_back(
+                    concatenated({toPrintable(file, MostCharactersOfAName).text, ", line ", std::to_string(line.number),
+                                  " ", problem, ": \"", toPrintable(line.text, MostCharactersOfAName).text, "\""}));
+        }
+    }
+    if (count > MostOfAKind)
+        lines.push_back(concatenated(
+            {isNew ? "New cut, " : "Old cut, ", counted(count - MostOfAKind, "further line"), " not read"}));
 }
 
 void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
@@ -299,16 +308,16 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
     std::array<std::size_t, DoubtWords.size()> counts{};
     for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
         const EventBase& event = cut.events().at(static_cast<std::size_t>(doubtful.event));
-        if (++counts.at(static_cast<std::size_t>(doubtful.doubt)) <= MostOfOneDoubt)
+        if (++counts.at(static_cast<std::size_t>(doubtful.doubt)) <= MostOfAKind)
             lines.push_back(concatenated({toPrintable(event.edlFileName(), MostCharactersOfAName).text, ", event ",
                                           std::to_string(event.eventNumber()), " (", nameOf(&event),
                                           "): ", explanationOf(doubtful.doubt)}));
     }
     for (std::size_t doubt = 0; doubt < counts.size(); ++doubt) {
-        if (counts[doubt] > MostOfOneDoubt)
-            lines.push_back(concatenated({isNew ? "New cut, " : "Old cut, ",
-                                          counted(counts[doubt] - MostOfOneDoubt, "further event"), ": ",
-                                          explanationOf(static_cast<PictureDoubt>(doubt))}));
+        if (counts[doubt] > MostOfAKind)
+            lines.push_back(
+                concatenated({isNew ? "New cut, " : "Old cut, ", counted(counts[doubt] - MostOfAKind, "further event"),
+                              ": ", explanationOf(static_cast<PictureDoubt>(doubt))}));
     }
 }
 

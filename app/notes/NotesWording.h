@@ -12,11 +12,10 @@
 
 namespace cadrel::app {
 
-/// The words for a ChangeKind, a StepAction, a PictureDoubt and an EventFlaw in files for other programs.
+/// The words for a ChangeKind, a StepAction and a PictureDoubt in files for other programs.
 std::string_view wordOf(core::ChangeKind kind);
 std::string_view wordOf(core::StepAction action);
 std::string_view wordOf(core::PictureDoubt doubt);
-std::string_view wordOfFlaw(std::int32_t flaw);
 
 /// The texts one after the other.
 std::string concatenated(std::initializer_list<std::string_view> texts);
@@ -66,6 +65,7 @@ public:
 private:
     std::string transitionText(const core::PictureChange& change) const;
     void addDoubts(bool isNew, std::vector<std::string>& lines) const;
+    void addUnread(bool isNew, std::vector<std::string>& lines) const;
 
     const NotesDocument& m_document;
 };
