@@ -66,11 +66,22 @@ KindLabel labelOf(ChangeKind kind)
     return {"transition", "transition"};
 }
 
-constexpr std::array Filters{std::pair{"kept", "kept"},           std::pair{"trimmed", "trimmed"},
-                             std::pair{"lifted", "lifted"},       std::pair{"inserted", "inserted"},
-                             std::pair{"replaced", "replaced"},   std::pair{"moved", "moved"},
-                             std::pair{"doubled", "doubled"},     std::pair{"retimed", "retimed"},
-                             std::pair{"version", "VFX version"}, std::pair{"transition", "transitions"}};
+struct Filter {
+    const char* value;
+    const char* label;
+    const char* hue; ///< the colour of its marks
+};
+
+constexpr std::array Filters{Filter{"kept", "kept", "kept"},
+                             Filter{"trimmed", "trimmed", "lifted"},
+                             Filter{"lifted", "lifted", "lifted"},
+                             Filter{"inserted", "inserted", "inserted"},
+                             Filter{"replaced", "replaced", "other"},
+                             Filter{"moved", "moved", "moved"},
+                             Filter{"doubled", "doubled", "doubled"},
+                             Filter{"retimed", "retimed", "other"},
+                             Filter{"version", "VFX version", "other"},
+                             Filter{"transition", "transitions", "other"}};
 
 std::string escaped(const std::string& text)
 {
@@ -221,8 +232,9 @@ private:
         const std::string title = m_words.action(entry);
         for (const FrameSpan& removed : step.removedFrames)
             m_sink(box(removed, true, "lifted", idOf(entry), title));
-        if (step.action == core::StepAction::Replace && step.inserted.length > 0)
-            m_sink(box(step.inserted, false, "inserted", idOf(entry), title));
+        if (step.inserted.length > 0)
+            m_sink(box(step.inserted, false, step.action == core::StepAction::Relabel ? "version" : "inserted",
+                       idOf(entry), title));
         for (const PictureChange& change : step.changes) {
             if (change.kind == ChangeKind::Doubled)
                 m_sink(band(*change.inOld, *change.inNew, "doubled", idOf(entry)));
@@ -260,12 +272,13 @@ private:
         m_sink("<div class=\"tools\"><button data-zoom=\"0.6\">zoom in</button><button data-zoom=\"1.7\">zoom "
                "out</button><button data-zoom=\"1e9\">all</button>");
         const std::set<std::string> kinds = kindsOfAll();
-        for (const auto& [value, label] : Filters) {
+        for (const auto& [value, label, hue] : Filters) {
             if (kinds.contains(value))
-                m_sink(std::string("<label><input type=\"checkbox\" checked value=\"") + value + "\">" + label +
-                       "</label>");
+                m_sink(concatenated({"<label><input type=\"checkbox\" checked value=\"", value,
+                                     "\"><i style=\"--hue: var(--", hue, ")\"></i>", label, "</label>"}));
         }
-        m_sink("<span class=\"dim\">n and p: next and previous step; + and -: zoom</span></div>\n");
+        m_sink("<span class=\"dim\">n and p: next and previous step; + and -: zoom</span></div>\n"
+               "<p class=\"left\" hidden></p>\n");
     }
 
     std::set<std::string> kindsOfAll() const
@@ -304,13 +317,14 @@ private:
     {
         m_sink("<h2>" + escaped(m_words.reelTitle(reel)) + "</h2>\n<p class=\"dim\">" +
                escaped(m_words.reelLengths(reel)) +
-               "</p>\n<table>\n<thead><tr><th class=\"num\">step</th><th>at</th><th>what to do</th><th>what "
+               "</p>\n<div class=\"wide\"><table>\n<thead><tr><th class=\"num\">step</th><th>at</th><th>what to "
+               "do</th><th>what "
                "changes</th><th class=\"num\">length</th><th class=\"num\">offset</th></tr></thead>\n<tbody>\n");
         std::size_t kept = 0;
         for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
             m_sink(entry.step() == nullptr ? rowOf(entry, reel, keptId(reel, ++kept))
                                            : rowOf(entry, reel, idOf(entry)));
-        m_sink("</tbody>\n</table>\n");
+        m_sink("</tbody>\n</table></div>\n");
     }
 
     std::string rowOf(const NoteEntry& entry, std::size_t reel, const std::string& id) const
