@@ -21,6 +21,8 @@ p { margin: 0 0 12px; overflow-wrap: anywhere; } .dim { color: var(--dim); }
 .strip { background: var(--card); border: 1px solid var(--line); border-radius: 6px; padding: 10px 14px; }
 .strip div { display: flex; justify-content: space-between; gap: 16px; font-size: 13px; color: var(--dim); }
 .strip .tc, td.tc { font-family: ui-monospace, monospace; font-variant-numeric: tabular-nums; white-space: nowrap; }
+.strip .reels { position: relative; display: block; height: 15px; overflow: hidden; font-size: 11px; }
+.reels b { position: absolute; padding-left: 3px; font-weight: 500; }
 svg { display: block; width: 100%; height: 190px; margin: 4px 0; cursor: pointer; }
 svg:focus-visible, tr:focus-visible, button:focus-visible { outline: 2px solid var(--other); outline-offset: 1px; }
 .base { fill: var(--line); } .reel { stroke: var(--ink); stroke-width: 1.5; vector-effect: non-scaling-stroke; }
@@ -35,6 +37,9 @@ svg [data-step]:hover { fill-opacity: .95; } svg .off { display: none; }
 .tools button { font: inherit; padding: 2px 10px; background: var(--card); color: inherit; border: 1px solid var(--line);
   border-radius: 5px; }
 .wide { overflow-x: auto; } table { width: 100%; border-collapse: collapse; margin-top: 10px; }
+.steps { table-layout: fixed; min-width: 780px; } .steps th:nth-child(1) { width: 52px; } .steps th:nth-child(2) { width: 108px; }
+.steps th:nth-child(3) { width: 300px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 118px; }
+.overview { width: auto; } .overview td, .overview th { padding: 2px 18px 2px 10px; } .overview a { color: inherit; }
 th { text-align: left; font-size: 13px; font-weight: 500; color: var(--dim); border-bottom: 1px solid var(--line);
   padding: 4px 10px; }
 td { padding: 6px 10px; border-bottom: 1px solid var(--line); vertical-align: top; }
@@ -47,13 +52,15 @@ tbody tr[id] { scroll-margin-top: 20px; cursor: pointer; }
 .tag.lifted, .tag.head-trimmed, .tag.tail-trimmed { --hue: var(--lifted); }
 .tag.plus, .tag.inserted { --hue: var(--inserted); } .tag.moved { --hue: var(--moved); }
 .tag.doubled { --hue: var(--doubled); }
-.change { margin: 0 0 2px; } .change small { color: var(--dim); }
+.change { margin: 0 0 2px; overflow-wrap: break-word; } .change small { color: var(--dim); }
 ol.largest { columns: 2; column-gap: 40px; padding-left: 24px; margin: 8px 0; font-size: 14px; }
 ol.largest a { color: inherit; }
 [hidden] { display: none !important; }
 @media (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
 @media print { :root { color-scheme: light; --paper: #fff; --card: #fff; } .wide { overflow: visible; } body { padding: 0; font-size: 10pt; } .tools { display: none; }
   * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2 { break-after: avoid; }
+  .steps { min-width: 0; } .steps th:nth-child(1) { width: 30px; } .steps th:nth-child(2) { width: 80px; }
+  .steps th:nth-child(3) { width: 220px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 90px; }
   svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } td.tc { font-size: 8pt; }
   tr.k td { font-size: 7.5pt; } }
 )";
@@ -62,11 +69,17 @@ const std::string_view NotesPage::Script = R"(
 const svg = document.querySelector('svg'), whole = svg.viewBox.baseVal.width;
 const rows = [...document.querySelectorAll('tr[id]')], steps = rows.filter(row => !row.classList.contains('k'));
 const marks = [...svg.querySelectorAll('[data-step]')];
+const reelNumbers = [...document.querySelectorAll('.reels b')];
 let left = 0, width = whole, at = -1;
 function show() {
   width = Math.min(whole, Math.max(whole / 2000, width));
   left = Math.min(whole - width, Math.max(0, left));
   svg.setAttribute('viewBox', `${left} 0 ${width} 190`);
+  reelNumbers.forEach(number => {
+    const at = (number.dataset.at - left) / width;
+    number.style.left = `${at * 100}%`;
+    number.hidden = at < 0 || at > 1;
+  });
 }
 function zoom(factor, middle = left + width / 2) {
   const share = (middle - left) / width;
@@ -126,6 +139,7 @@ function filter() {
     `${steps.filter(row => !row.hidden).length} of ${steps.length} steps are shown.`;
 }
 boxes.forEach(box => box.addEventListener('change', filter));
+show();
 document.querySelectorAll('[data-zoom]').forEach(b => b.addEventListener('click', () => zoom(+b.dataset.zoom)));
 document.querySelectorAll('a[href^="#s"]').forEach(a => a.addEventListener('click', e => {
   e.preventDefault(); choose(a.hash.slice(1), true); reveal(a.hash.slice(1)); }));

@@ -6,6 +6,7 @@
 #include "app/console/Wording.h"
 #include "app/edl/GenerationReport.h"
 #include "core/edl/EventBase.h"
+#include "core/edl/MatchedName.h"
 #include "core/time/Timecode.h"
 
 #include <algorithm>
@@ -30,6 +31,8 @@ namespace {
 
 constexpr std::int32_t FramesPerFoot = 16;
 constexpr std::size_t MostCharactersOfAName = 39;
+/// The files of a cut are named one by one up to so many.
+constexpr std::size_t MostFilesNamed = 3;
 /// So many events with the same doubt are named, and so many lines that were not read.
 constexpr std::size_t MostOfAKind = 5;
 
@@ -198,6 +201,12 @@ std::string NotesWording::transitionText(const PictureChange& change) const
     return type + lengthOf(change.oldShot) + " now " + lengthOf(change.newShot) + " frames";
 }
 
+/// The name in which its version stands.
+std::string NotesWording::versionName(const EventBase* shot) const
+{
+    return shot == nullptr ? std::string() : core::nameBy(m_document.matchBy, *shot);
+}
+
 ChangeWords NotesWording::describe(const PictureChange& change) const
 {
     const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
@@ -232,8 +241,8 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
                 name,
                 {}};
     case ChangeKind::VersionChanged:
-        return {"was " + toPrintable(change.oldShot == nullptr ? "" : change.oldShot->rollName(), 28).text,
-                toPrintable(shot == nullptr ? "" : shot->rollName(), MostCharactersOfAName).text,
+        return {"was " + toPrintable(versionName(change.oldShot), 28).text,
+                toPrintable(versionName(change.newShot), MostCharactersOfAName).text,
                 {}};
     case ChangeKind::TransitionAdded:
     case ChangeKind::TransitionRemoved:
@@ -258,11 +267,46 @@ std::string NotesWording::reelTitle(std::size_t reel) const
     return oldStart == start ? title : title + ", began at " + timecode(oldStart);
 }
 
+std::string NotesWording::reelStart(std::size_t reel) const
+{
+    const auto& notes = m_document.notes;
+    const core::ReelChange& pair = notes.reels()[reel].pair;
+    return timecode(pair.newReel ? notes.newCut().reels()[*pair.newReel].timecodeStart
+                                 : notes.oldCut().reels()[*pair.oldReel].timecodeStart);
+}
+
 std::string NotesWording::reelLengths(std::size_t reel) const
 {
     const core::ReelNotes& notes = m_document.notes.reels()[reel];
+    if (notes.before == notes.after)
+        return timecode(notes.before) + " before and after" + (stepsOf(reel) == 0 ? ", nothing has changed" : "");
     return timecode(notes.before) + " before, " + timecode(notes.after) + " after, " +
            change(notes.after - notes.before);
+}
+
+std::size_t NotesWording::stepsOf(std::size_t reel) const
+{
+    const auto& entries = m_document.notes.reels()[reel].entries;
+    return static_cast<std::size_t>(
+        std::count_if(entries.begin(), entries.end(), [](const NoteEntry& entry) { return entry.step() != nullptr; }));
+}
+
+std::string NotesWording::shotsOf(const NoteEntry& entry) const
+{
+    const std::size_t more = entry.step()->changes.size() - 1;
+    const std::string shot = describe(largestChange(entry)).shot;
+    if (more == 0)
+        return shot;
+    const std::string text = concatenated({" and ", std::to_string(more), " more"});
+    return toPrintable(shot, MostCharactersOfAName - text.size()).text + text;
+}
+
+std::string NotesWording::cutName(bool isNew) const
+{
+    const std::vector<std::string>& names = isNew ? m_document.cuts.newNames : m_document.cuts.oldNames;
+    if (names.size() <= MostFilesNamed)
+        return joined(names);
+    return concatenated({names.front(), " ... ", names.back(), " (", std::to_string(names.size()), " files)"});
 }
 
 std::vector<std::string> NotesWording::remarks() const
@@ -323,8 +367,7 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
 
 std::string NotesWording::cutText(bool isNew) const
 {
-    return describeEvents(isNew ? m_document.newEvents : m_document.oldEvents,
-                          isNew ? m_document.cuts.newNames : m_document.cuts.oldNames,
+    return describeEvents(isNew ? m_document.newEvents : m_document.oldEvents, {cutName(isNew)},
                           countOf(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread));
 }
 

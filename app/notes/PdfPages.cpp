@@ -50,6 +50,12 @@ double PdfPages::widthOf(const std::string& utf8)
     return extents.x_advance;
 }
 
+double PdfPages::widthOf(const std::string& utf8, const PdfFont& font)
+{
+    set(font, {});
+    return widthOf(utf8);
+}
+
 void PdfPages::text(double x, double y, const std::string& utf8, const PdfFont& font, const PdfColour& colour)
 {
     set(font, colour);

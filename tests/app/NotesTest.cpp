@@ -25,6 +25,13 @@ std::vector<std::string> linesOf(const std::string& text)
     return lines;
 }
 
+/// The characters of a text in UTF-8.
+std::ptrdiff_t columnsOf(const std::string& text)
+{
+    return std::count_if(text.begin(), text.end(),
+                         [](char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U; });
+}
+
 /// An old and a new cut in a folder of their own.
 class Cuts {
 public:
@@ -107,7 +114,7 @@ TEST(Notes, NoLineOfTheTextIsWiderThan80Columns)
     const Outcome outcome = runCadrel(reel3({"--feet"}));
 
     for (const std::string& line : linesOf(outcome.out))
-        EXPECT_LE(line.size(), 80U) << line;
+        EXPECT_LE(columnsOf(line), 80) << line;
 }
 
 TEST(Notes, LongNamesMakeNoLineWider)
@@ -372,7 +379,7 @@ TEST(Notes, WhatIsHealedDoubtedAndNotReadStandsInEveryForm)
             EXPECT_NE(unbroken(form).find(remark), std::string::npos) << remark << "\n" << form;
     }
     for (const std::string& line : linesOf(text))
-        EXPECT_LE(line.size(), 80U) << line;
+        EXPECT_LE(columnsOf(line), 80) << line;
 }
 
 TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
