@@ -4,6 +4,7 @@
 #   make test           every test; PRESET=asan runs them under the sanitizers
 #   make build          the programs into build/release/bin, the libraries into build/release/lib
 #   make bench          the benchmarks, and the whole program against its bounds
+#   make pictures       the pictures of change notes in docs/pictures
 #   make fuzz           every fuzzer for FUZZ_SECONDS from its corpus
 #   make format         formats every C++ file; make check-format only looks
 
@@ -13,7 +14,7 @@ FUZZ_SECONDS ?= 20
 sources = $(shell find src standin app examples tests bench fuzz -name '*.cpp' -o -name '*.h')
 reel3 = examples/reel3
 
-.PHONY: run test build bench fuzz format check-format clean
+.PHONY: run test build bench pictures fuzz format check-format clean
 
 run:
 	@cmake/build.sh release cadrel
@@ -38,6 +39,11 @@ bench:
 	build/release/bin/cadrel_bench
 	build/release/bin/cadrel_bench_host
 	build/release/bin/cadrel_bench_program build/release/bin/cadrel build/bench
+
+pictures:
+	@cmake/build.sh release cadrel make_cuts
+	@cmake/install-packages.sh pictures
+	docs/make-pictures.sh build/release/bin
 
 fuzz:
 	@cmake/build.sh fuzz fuzzers
