@@ -5,8 +5,8 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/ProgrammePlace.h"
-#include "core/keep/FrameRange.h"
-#include "core/keep/Reels.h"
+#include "core/picture/FrameRange.h"
+#include "core/picture/Reels.h"
 #include "core/time/Timecode.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/StoredProjects.h"

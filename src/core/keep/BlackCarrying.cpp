@@ -17,14 +17,6 @@ namespace {
 constexpr FrameRange AllTime{std::numeric_limits<std::int32_t>::min() / 2,
                              std::numeric_limits<std::int32_t>::max() / 2};
 
-std::int32_t lengthOf(const FrameRanges& ranges)
-{
-    std::int32_t length = 0;
-    for (const FrameRange& range : ranges)
-        length += range.length();
-    return length;
-}
-
 /// The shifts of those frames of an island of old picture that survive nearest to its start and to its end.
 struct IslandEdges {
     std::int32_t first = std::numeric_limits<std::int32_t>::max();

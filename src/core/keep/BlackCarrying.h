@@ -4,8 +4,8 @@
 
 #include "core/keep/CarriedStretches.h"
 #include "core/keep/ChangeStretch.h"
-#include "core/keep/FrameRange.h"
-#include "core/keep/Reels.h"
+#include "core/picture/FrameRange.h"
+#include "core/picture/Reels.h"
 #include "core/time/Framerate.h"
 
 #include <cstdint>

@@ -3,7 +3,7 @@
 #pragma once
 
 #include "core/keep/CarriedStretches.h"
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 #include "core/time/SecondsRange.h"
 
 #include <cstdint>
@@ -36,7 +36,7 @@ struct KeepRefusal {
     FrameRanges material; ///< in frames of the old programme; may reach out of the day
 
     /// How much of `material` there is, in frames.
-    std::int32_t amount() const;
+    std::int32_t amount() const { return lengthOf(material); }
 };
 
 /// What a run has to do.

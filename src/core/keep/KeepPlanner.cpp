@@ -8,9 +8,9 @@
 #include "core/keep/ChangeStretch.h"
 #include "core/keep/Material.h"
 #include "core/keep/PictureCarrying.h"
-#include "core/keep/PictureLine.h"
-#include "core/keep/PictureNames.h"
-#include "core/keep/Reels.h"
+#include "core/picture/PictureLine.h"
+#include "core/picture/PictureNames.h"
+#include "core/picture/Reels.h"
 
 #include <utility>
 

@@ -3,9 +3,9 @@
 #pragma once
 
 #include "core/keep/CarriedStretches.h"
-#include "core/keep/PictureComparison.h"
-#include "core/keep/PictureLine.h"
-#include "core/keep/Reels.h"
+#include "core/picture/PictureComparison.h"
+#include "core/picture/PictureLine.h"
+#include "core/picture/Reels.h"
 #include "core/time/Framerate.h"
 
 #include <optional>

@@ -3,7 +3,7 @@
 #pragma once
 
 #include "core/edl/EventList.h"
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 
 #include <cstdint>
 #include <string>
