@@ -200,6 +200,11 @@ void MemoSync::remember(const Track& memos, const Previewed& previewed)
     m_remembered = std::move(found);
 }
 
+std::vector<HostEvent> MemoSync::adrift(const Track& memos, const Previewed& previewed)
+{
+    return previewOf(PlacedMemos(memos), previewed).adrift;
+}
+
 void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTransaction& transaction)
 {
     PlacedMemos placed(memos);

@@ -50,6 +50,8 @@ public:
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.
     void remember(const Track& memos, const Previewed& previewed);
     void forget() { m_remembered.clear(); }
+    /// The memos after the preview offset that stand in no stretch of the preview, and so have no part in what is followed.
+    static std::vector<HostEvent> adrift(const Track& memos, const Previewed& previewed);
 
 private:
     /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's
