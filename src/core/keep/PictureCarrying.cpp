@@ -16,20 +16,15 @@ PictureCarrying::PictureCarrying(const PictureLine& oldLine, const PictureLine& 
 
 void PictureCarrying::run(const EventList& changeEvents, const Framerate& framerate)
 {
-    carryInPlace();
     carryReelEnds();
+    carryInPlace();
     carryChangeEvents(changeEvents, framerate);
     carryHoles();
 }
 
-void PictureCarrying::carryInPlace()
-{
-    for (const FrameRange& reel : m_reels.ofNew())
-        carryEqual(0, reel, CarriedFrom::Unchanged);
-}
-
-// Material that stands twice can send a shot of the change EDL onto its twin. Where only one thing has changed, all
-// before it is as it was against the reel's start, and all after it against the reel's end.
+// Of material that stands twice, one place can have come to stand where the other was, and the change EDL can send a shot
+// onto its twin. Where only one thing has changed, all before it is as it was against the reel's start, and all after it
+// against the reel's end.
 void PictureCarrying::carryReelEnds()
 {
     for (const ReelPair& pair : m_reels.pairs()) {
@@ -39,13 +34,19 @@ void PictureCarrying::carryReelEnds()
         const FrameRange fromStart = common(pair.startShift());
         const FrameRanges afterHead = m_comparison.differencesUnder(pair.startShift(), fromStart);
         const std::int32_t headEnd = afterHead.empty() ? fromStart.end : afterHead.front().start;
-        carryEqual(pair.startShift(), {fromStart.start, headEnd}, CarriedFrom::Cut);
+        carryEqual(pair.startShift(), {fromStart.start, headEnd});
 
         const FrameRange upToEnd = common(pair.endShift());
         const FrameRanges beforeTail = m_comparison.differencesUnder(pair.endShift(), upToEnd);
         const std::int32_t tailStart = beforeTail.empty() ? upToEnd.start : beforeTail.back().end;
-        carryEqual(pair.endShift(), {tailStart, upToEnd.end}, CarriedFrom::Cut);
+        carryEqual(pair.endShift(), {tailStart, upToEnd.end});
     }
+}
+
+void PictureCarrying::carryInPlace()
+{
+    for (const FrameRange& reel : m_reels.ofNew())
+        carryEqual(0, reel);
 }
 
 void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const Framerate& framerate)
@@ -64,6 +65,11 @@ void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const Fra
             m_carried.carry(m_comparison.litUnder(stretch->shift, stretch->destination), stretch->shift,
                             CarriedFrom::Cut);
     }
+}
+
+void PictureCarrying::carryEqual(std::int32_t shift, const FrameRange& bounds)
+{
+    carryEqual(shift, bounds, shift == 0 ? CarriedFrom::Unchanged : CarriedFrom::Cut);
 }
 
 void PictureCarrying::carryHoles()

@@ -15,8 +15,8 @@ namespace cadrel::core {
 class EventBase;
 class EventList;
 
-/// Carries over what has a picture in both cuts: first what is equal at the same time, then what is equal from the start
-/// or up to the end of a reel, then what the change EDL tells, and last the holes between.
+/// Carries over what has a picture in both cuts: first what is equal from the start of a reel or up to its end, then what
+/// is equal at the same time, then what the change EDL tells, and last the holes between.
 class PictureCarrying {
 public:
     PictureCarrying(const PictureLine& oldLine, const PictureLine& newLine, const Reels& reels,
@@ -33,10 +33,11 @@ private:
         std::optional<std::int32_t> rightShift;
     };
 
-    void carryInPlace();
     void carryReelEnds();
+    void carryInPlace();
     void carryChangeEvents(const EventList& changeEvents, const Framerate& framerate);
     void carryHoles();
+    void carryEqual(std::int32_t shift, const FrameRange& bounds);
     void carryEqual(std::int32_t shift, const FrameRange& bounds, CarriedFrom from);
     std::vector<Hole> findHoles() const;
     std::vector<Hole> holesOf(const FrameRange& newReel, const ReelPair* pair) const;

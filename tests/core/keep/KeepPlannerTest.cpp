@@ -136,6 +136,18 @@ TEST_F(KeepPlannerTest, AfterOneChangeAShotDoesNotGoToItsTwinEither)
 
 //  old    |--- A ---|- F -|-- B --|
 //  new    |X|--- A ---|- F -|- B -|
+// The second A shows at frame 1120 what the first one, moved by 30, shows there in the new cut.
+TEST_F(KeepPlannerTest, AfterOneChangeNoFrameStaysWhereItsTwinHappenedToStand)
+{
+    const Film before = Film().at(1000).shot("X", 0, 70).shot("A", 0, 30).shot("B", 0, 20).shot("A", 20, 40);
+    const Film after = before.withInsertBefore(1, "N", 30);
+
+    const KeepPlan plan = planFor(before, after);
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1070..1160 to 1100..1190: cut"}));
+    EXPECT_EQ(hullOf(plan), "1070..1190");
+}
+
 TEST_F(KeepPlannerTest, AFreezeGoesOnWithTheShotBeforeIt)
 {
     const Film before = Film().at(1000).shot("A", 0, 100).freeze("F", 7, 20).shot("B", 0, 50);
@@ -640,6 +652,58 @@ TEST_F(KeepPlannerTest, SoundInBlackBehindALiftedShotGoesAlongWithTheShotAfterIt
     EXPECT_EQ(linesOf(plan.events), (Lines{"1130..1190 to 1100..1160: black cut"}));
     EXPECT_EQ(hullOf(plan), "1100..1190");
     EXPECT_EQ(linesOf(plan.lost), Lines());
+}
+
+//  old           |-- A --|- X -| sound |------- Y -------|-- B --|
+//  new   (here)  |-- A --|-- B --|
+TEST_F(KeepPlannerTest, SoundInTheBlackOfALiftedSceneDoesNotGoInFrontOfTheReel)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("X", 0, 30).black(10).shot("Y", 0, 140).shot("B", 0, 50);
+
+    const KeepPlan plan = planFor(before, filmOfAAndB(), {{1130, 1140}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1280..1330 to 1100..1150: cut"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"1130..1140"}));
+}
+
+//  old   |-- A --|- X -| sound |- Y -|-- B --|
+//  new   |-- A --|-- B --|     (here)
+TEST_F(KeepPlannerTest, SoundInTheBlackOfALiftedSceneDoesNotStayBehindTheReel)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("X", 0, 60).black(10).shot("Y", 0, 10).shot("B", 0, 50);
+
+    const KeepPlan plan = planFor(before, filmOfAAndB(), {{1160, 1170}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1180..1230 to 1100..1150: cut"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"1160..1170"}));
+}
+
+//  old   |-- A --|- X -| sound |- Y -|- B -| other |- C -|
+//  new   |-- A --|- B -| other |- C -|
+TEST_F(KeepPlannerTest, SoundInTheBlackOfALiftedSceneDoesNotTakeTheRoomOfThatAfterIt)
+{
+    const Film rest = Film().at(1100).shot("B", 0, 30).black(10).shot("C", 0, 20);
+    const Film before =
+        Film().at(1000).shot("A", 0, 100).shot("X", 0, 30).black(10).shot("Y", 0, 10).append(rest, 1100);
+    const Film after = Film().at(1000).shot("A", 0, 100).append(rest, 1100);
+
+    const KeepPlan plan = planFor(before, after, {{1130, 1140}, {1180, 1190}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1150..1210 to 1100..1160: cut black cut"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"1130..1140"}));
+}
+
+//  old   |-- A --|- X -| sound |- Y -|-- B --|
+//  new   |-- A --|- P -| sound |- Q -|-- B --|
+TEST_F(KeepPlannerTest, SoundInBlackBetweenTwoShotsThatWereReplacedStays)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("X", 0, 30).black(10).shot("Y", 0, 10).shot("B", 0, 50);
+    const Film after = Film().at(1000).shot("A", 0, 100).shot("P", 0, 30).black(10).shot("Q", 0, 10).shot("B", 0, 50);
+
+    const KeepPlan plan = planFor(before, after, {{1130, 1140}});
+
+    EXPECT_EQ(linesOf(plan.lost), Lines());
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1130..1140 to 1130..1140: black"}));
 }
 
 TEST_F(KeepPlannerTest, WhatWouldStayIsLostWhereNewPictureIsPushedOverIt)
