@@ -96,9 +96,9 @@ KeepPlan KeepPlanner::plan(const EventList& oldEvents, const EventList& newEvent
     plan.lost = black.lost();
     const std::vector<CarriedStretch> stretches = carried.stretches();
     restrictTo(spanOf(changedFrames(oldLine, newLine, black.material(), stretches)), joined(stretches), plan);
-    if (!reels.canBePaired() && !m_context.isForced)
-        plan.refusal = KeepRefusal{KeepRefusal::UnequalReels, reels.ofOld(), reels.ofNew(), {}};
-    else if (!black.outsideOfDay().empty())
+    if (!reels.canBePaired())
+        plan.questions.push_back({KeepRefusal::UnequalReels, reels.ofOld(), reels.ofNew(), {}});
+    if (!black.outsideOfDay().empty())
         plan.refusal = refusalFor(KeepRefusal::OutsideOfDay, united(black.outsideOfDay()));
     return plan;
 }
@@ -134,8 +134,8 @@ KeepPlan KeepPlanner::planGiven(const EventList& changeEvents) const
     }
     plan.lost = united(std::move(plan.lost));
     restrictTo(hull, std::move(events), plan);
-    if (!inTheWay.empty() && !m_context.isForced)
-        plan.refusal = refusalFor(KeepRefusal::MaterialInTheWay, inTheWay);
+    if (!inTheWay.empty())
+        plan.questions.push_back(refusalFor(KeepRefusal::MaterialInTheWay, inTheWay));
     return plan;
 }
 

@@ -38,14 +38,13 @@ EventList generatedChanges(const EventList& oldEvents, const EventList& newEvent
     return changes;
 }
 
-KeepPlan planFor(const Film& oldFilm, const Film& newFilm, const std::vector<SecondsRange>& material, bool isForced)
+KeepPlan planFor(const Film& oldFilm, const Film& newFilm, const std::vector<SecondsRange>& material)
 {
     const EventList oldEvents = oldFilm.list();
     const EventList newEvents = newFilm.list();
     core::KeepContext context;
     context.framerate = FrameASecond;
     context.material = material;
-    context.isForced = isForced;
     return core::KeepPlanner(context).plan(
         oldEvents, newEvents,
         generatedChanges(oldEvents, newEvents, core::MatchBy::RollName, core::HealMode::Normal, FrameASecond));

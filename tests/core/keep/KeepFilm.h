@@ -19,8 +19,7 @@ core::EventList generatedChanges(const core::EventList& oldEvents, const core::E
                                  std::int32_t matchBy, std::int32_t healMode, const core::Framerate& framerate);
 
 /// The plan for two films, with the change EDL that is generated of them.
-core::KeepPlan planFor(const Film& oldFilm, const Film& newFilm, const std::vector<core::SecondsRange>& material = {},
-                       bool isForced = false);
+core::KeepPlan planFor(const Film& oldFilm, const Film& newFilm, const std::vector<core::SecondsRange>& material = {});
 
 /// An event as "100..150 to 110..160: cut black", with the origins of its parts.
 std::string lineOf(const core::KeptEvent& event);

@@ -147,7 +147,6 @@ KeepPlan planOf(const EventList& oldEvents, const EventList& newEvents, const Ev
     context.framerate = framerate;
     context.matchBy = matchBy;
     context.material = material;
-    context.isForced = true;
     return KeepPlanner(context).plan(oldEvents, newEvents, changes);
 }
 
@@ -354,7 +353,7 @@ RC_GTEST_PROP(KeepLaw, NoFrameIsGivenAwayTwiceAndBlackNeitherTakenNorGivenTwice,
     const std::vector<SecondsRange> material = anyMaterial();
     const FrameModel model(oldFilm.list(), newFilm.list());
 
-    const KeepPlan plan = planFor(oldFilm, newFilm, material, true);
+    const KeepPlan plan = planFor(oldFilm, newFilm, material);
 
     const CarriedFrames carried(plan);
     RC_ASSERT(carried.isUnique());
@@ -417,7 +416,7 @@ RC_GTEST_PROP(KeepLaw, EqualPictureStaysAndGoesOnAsThePictureBesideIt, ())
     const EventList changes =
         generatedChanges(oldFilm.list(), newFilm.list(), core::MatchBy::RollName, core::HealMode::Normal, FrameASecond);
 
-    const KeepPlan plan = planFor(oldFilm, newFilm, anyMaterial(), true);
+    const KeepPlan plan = planFor(oldFilm, newFilm, anyMaterial());
 
     const CarriedFrames carried(plan);
     for (const FrameRange& reel : model.newReels()) {
@@ -443,7 +442,7 @@ RC_GTEST_PROP(KeepLaw, OutsideOfTheHullNothingChanges, ())
     const std::vector<SecondsRange> material = anyMaterial();
     const FrameModel model(oldFilm.list(), newFilm.list());
 
-    const KeepPlan plan = planFor(oldFilm, newFilm, material, true);
+    const KeepPlan plan = planFor(oldFilm, newFilm, material);
 
     const CarriedFrames carried(plan);
     for (std::int32_t frame = 0; frame < FrameModel::Length; ++frame) {
@@ -472,7 +471,7 @@ RC_GTEST_PROP(KeepLaw, AfterOneChangeAllMovesByOneShiftAndNothingBefore, ())
 
     const KeepPlan plan = planFor(film, change.changed, material);
 
-    RC_ASSERT(!plan.refusal);
+    RC_ASSERT(plan.questions.empty() && !plan.refusal);
     if (shift == 0) {
         RC_ASSERT(!plan.needsRun());
         return;
@@ -504,7 +503,7 @@ TEST(KeepLaw, EveryEdlOfTheTreeOntoItselfNeedsNoRun)
                     planOf(events, events, changes, {{10, 20}, {3000, 4000}, {86300, 90000}}, framerate, matchBy);
 
                 EXPECT_FALSE(plan.needsRun()) << file << " " << acceptAudio << " " << matchBy << " " << hullOf(plan);
-                EXPECT_FALSE(plan.refusal) << file;
+                EXPECT_TRUE(plan.questions.empty() && !plan.refusal) << file;
                 pictures += plan.untouched.size();
             }
         }

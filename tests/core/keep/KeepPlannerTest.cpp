@@ -53,6 +53,7 @@ TEST_F(KeepPlannerTest, TheSameCutNeedsNoRunWhateverStandsAroundIt)
 
     EXPECT_EQ(hullOf(plan), "none");
     EXPECT_FALSE(plan.needsRun());
+    EXPECT_TRUE(plan.questions.empty());
     EXPECT_FALSE(plan.refusal);
     EXPECT_EQ(linesOf(plan.events), Lines());
     EXPECT_EQ(linesOf(plan.lost), Lines());
@@ -505,20 +506,20 @@ TEST_F(KeepPlannerTest, UnequalNumbersOfReelsAreAQuestion)
 
     const KeepPlan plan = planFor(before, after);
 
-    ASSERT_TRUE(plan.refusal);
-    EXPECT_EQ(plan.refusal->reason, KeepRefusal::UnequalReels);
-    EXPECT_EQ(linesOf(plan.refusal->oldReels), (Lines{"1000..1100", "1160..1210"}));
-    EXPECT_EQ(linesOf(plan.refusal->newReels), (Lines{"1000..1209"}));
+    ASSERT_EQ(plan.questions.size(), 1U);
+    EXPECT_EQ(plan.questions.front().reason, KeepRefusal::UnequalReels);
+    EXPECT_EQ(linesOf(plan.questions.front().oldReels), (Lines{"1000..1100", "1160..1210"}));
+    EXPECT_EQ(linesOf(plan.questions.front().newReels), (Lines{"1000..1209"}));
+    EXPECT_FALSE(plan.refusal);
 }
 
-TEST_F(KeepPlannerTest, WhereReelsCannotBePairedAForcedPlanLeavesBlackInItsPlace)
+TEST_F(KeepPlannerTest, WhereReelsCannotBePairedBlackStaysInItsPlace)
 {
     const Film before = Film().at(1000).shot("A", 0, 100).black(60).shot("B", 0, 50);
     const Film after = Film().at(1000).shot("A", 0, 100).black(59).shot("B", 0, 50);
 
-    const KeepPlan plan = planFor(before, after, {{1100, 1110}, {1210, 1215}}, true);
+    const KeepPlan plan = planFor(before, after, {{1100, 1110}, {1210, 1215}});
 
-    EXPECT_FALSE(plan.refusal);
     EXPECT_EQ(linesOf(plan.events), (Lines{"1160..1210 to 1159..1209: cut"}));
     EXPECT_EQ(linesOf(plan.lost), Lines());
 }
@@ -596,7 +597,7 @@ TEST_F(KeepPlannerTest, AGivenChangeEdlIsTakenAsItIsWithinTheHullOfBothSides)
 
     const KeepPlan plan = KeepPlanner(contextWith({{0, 5}, {20, 70}, {100, 110}})).planGiven(changes);
 
-    EXPECT_FALSE(plan.refusal);
+    EXPECT_TRUE(plan.questions.empty());
     EXPECT_EQ(linesOf(plan.events), (Lines{"60..70 to 20..30: cut", "10..20 to 30..40: cut"}));
     EXPECT_EQ(hullOf(plan), "10..70");
 }
@@ -611,7 +612,7 @@ TEST_F(KeepPlannerTest, WhatStandsInAGapOfTheSourcesOfAGivenChangeEdlIsToldAsLos
 
     const KeepPlan plan = KeepPlanner(contextWith({{0, 22}, {25, 28}, {29, 50}})).planGiven(changes);
 
-    EXPECT_FALSE(plan.refusal);
+    EXPECT_TRUE(plan.questions.empty());
     EXPECT_EQ(linesOf(plan.lost), (Lines{"20..30"})); // told once, from the first to the last
     EXPECT_EQ(linesOf(KeepPlanner(contextWith({{0, 20}, {25, 28}, {30, 50}})).planGiven(changes).lost),
               (Lines{"25..28"}));
@@ -628,31 +629,28 @@ TEST_F(KeepPlannerTest, WhatStandsBetweenTheOldAndTheNewPlaceOfAGivenChangeEdlIs
         return KeepPlanner(contextWith({{10, 20}, material})).planGiven(changes);
     };
 
-    ASSERT_TRUE(planWith({20, 21}).refusal);
-    EXPECT_EQ(planWith({20, 21}).refusal->reason, KeepRefusal::MaterialInTheWay);
-    EXPECT_EQ(planWith({20, 21}).refusal->amount(), 1);
+    ASSERT_EQ(planWith({20, 21}).questions.size(), 1U);
+    EXPECT_EQ(planWith({20, 21}).questions.front().reason, KeepRefusal::MaterialInTheWay);
+    EXPECT_EQ(planWith({20, 21}).questions.front().amount(), 1);
     EXPECT_EQ(linesOf(planWith({25, 45}).lost), (Lines{"25..45"}));
-    EXPECT_TRUE(planWith({49, 60}).refusal);
-    EXPECT_FALSE(planWith({50, 60}).refusal);
-    EXPECT_FALSE(planWith({5, 10}).refusal);
+    EXPECT_FALSE(planWith({49, 60}).questions.empty());
+    EXPECT_TRUE(planWith({50, 60}).questions.empty());
+    EXPECT_TRUE(planWith({5, 10}).questions.empty());
 }
 
-TEST_F(KeepPlannerTest, MaterialInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
+TEST_F(KeepPlannerTest, MaterialInTheWayOfAGivenChangeEdlIsAQuestionWithItsAmount)
 {
     EventList changes;
     changes.add(makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:15:00", "00:00:25:00"));
-    KeepContext context = contextWith({{12, 22}, {24, 90}});
 
-    const KeepPlan refused = KeepPlanner(context).planGiven(changes);
-    context.isForced = true;
-    const KeepPlan forced = KeepPlanner(context).planGiven(changes);
+    const KeepPlan plan = KeepPlanner(contextWith({{12, 22}, {24, 90}})).planGiven(changes);
 
-    ASSERT_TRUE(refused.refusal);
-    EXPECT_EQ(refused.refusal->reason, KeepRefusal::MaterialInTheWay);
-    EXPECT_EQ(refused.refusal->amount(), 3);
-    EXPECT_FALSE(forced.refusal);
-    EXPECT_EQ(linesOf(forced.lost), (Lines{"20..22", "24..25"}));
-    EXPECT_EQ(hullOf(forced), "10..25");
+    ASSERT_EQ(plan.questions.size(), 1U);
+    EXPECT_EQ(plan.questions.front().reason, KeepRefusal::MaterialInTheWay);
+    EXPECT_EQ(plan.questions.front().amount(), 3);
+    EXPECT_FALSE(plan.refusal);
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"20..22", "24..25"}));
+    EXPECT_EQ(hullOf(plan), "10..25");
 }
 
 //  old    |-- A --|- BL -|-- B --|
