@@ -4,8 +4,9 @@
 #   make test           every test; PRESET=asan runs them under the sanitizers
 #   make build          the programs into build/release/bin, the libraries into build/release/lib
 #   make bench          the benchmarks, and the whole program against its bounds
-#   make pictures       the pictures of change notes in docs/pictures
+#   make notes-pictures the pictures of change notes in docs/pictures
 #   make fuzz           every fuzzer for FUZZ_SECONDS from its corpus
+#   make pictures       draws the pictures of the window anew that the tests compare with; look at each before you keep it
 #   make format         formats every C++ file; make check-format only looks
 
 PRESET ?= release
@@ -13,8 +14,9 @@ FUZZ_SECONDS ?= 20
 
 sources = $(shell find src standin app examples tests bench fuzz -name '*.cpp' -o -name '*.h')
 reel3 = examples/reel3
+picture_tests = cadrel_gui_window_tests
 
-.PHONY: run test build bench pictures fuzz format check-format clean
+.PHONY: run test build bench fuzz pictures notes-pictures format check-format clean
 
 run:
 	@cmake/build.sh release cadrel
@@ -40,7 +42,7 @@ bench:
 	build/release/bin/cadrel_bench_host
 	build/release/bin/cadrel_bench_program build/release/bin/cadrel build/bench
 
-pictures:
+notes-pictures:
 	@cmake/build.sh release cadrel make_cuts
 	@cmake/install-packages.sh pictures
 	docs/make-pictures.sh build/release/bin
@@ -48,6 +50,11 @@ pictures:
 fuzz:
 	@cmake/build.sh fuzz fuzzers
 	fuzz/run.sh build/fuzz $(FUZZ_SECONDS)
+
+pictures:
+	@cmake/build.sh release $(picture_tests)
+	@for program in $(picture_tests); do CADREL_RENEW_PICTURES=1 build/release/bin/$$program; done
+	@git status --short tests/gui/pictures
 
 format:
 	@cmake/install-packages.sh format
