@@ -136,7 +136,9 @@ std::string NotesWording::action(const NoteEntry& entry) const
     const NoteStep& step = *entry.step();
     switch (step.action) {
     case StepAction::Move: {
-        const bool goesFurtherOn = step.from.reel == step.place.reel && step.from.frame < step.place.frame;
+        // Between reels the row stands in the one that loses or wins the picture.
+        const bool goesFurtherOn =
+            step.from.reel == step.place.reel ? step.from.frame < step.place.frame : entry.lengthChange < 0;
         const WorkPlace& other = goesFurtherOn ? step.place : step.from;
         return "move " + timecode(step.moved) + (goesFurtherOn ? " to " : " from ") +
                timecode(m_document.notes.timecodeOf(other));

@@ -398,6 +398,21 @@ TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
     EXPECT_NE(outcome.out.find("move 00:00:05:00 from 00:00:10:00"), std::string::npos) << outcome.out;
 }
 
+TEST(Notes, PictureThatGoesToALaterReelIsToldWhereItGoes)
+{
+    const std::string one = cut("001", "A001", "10:00:00:12 10:00:20:12", "01:00:00:00 01:00:20:00");
+    const Cuts film(one + cut("002", "A002", "10:00:00:00 10:00:10:00", "01:00:20:00 01:00:30:00") +
+                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:00:00 02:00:30:00"),
+                    one + cut("002", "A002", "10:00:00:00 10:00:10:00", "02:00:00:00 02:00:10:00") +
+                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:10:00 02:00:40:00"));
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_NE(outcome.out.find("   1  01:00:20:00  move 00:00:10:00 to 02:00:00:00     -00:00:10:00 -00:00:10:00\n"),
+              std::string::npos)
+        << outcome.out;
+}
+
 TEST(Notes, ACutHasNothingToTellOfItself)
 {
     const Cuts film(oldCut(), oldCut());
