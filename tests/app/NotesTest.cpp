@@ -350,6 +350,27 @@ TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)
         << outcome.out;
 }
 
+TEST(Notes, AFileThatComesUpDuringTheRunIsNotOverwritten)
+{
+    const std::string shots = manyShots(20000);
+    const TempFolder folder;
+    const std::string notes = folder / "notes.txt";
+    const std::vector<std::string> words{
+        "notes", "--old", folder.write("old.edl", shots), "--new", folder.write("new.edl", shots), "-o", notes};
+    const auto disturb = [&] { writeFile(notes, "of another program"); };
+
+    const Outcome outcome = runCadrelDisturbedAt("reading new.edl", words, disturb);
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_NE(outcome.out.find(notes + ": another program has written it meanwhile"), std::string::npos) << outcome.out;
+    EXPECT_EQ(contentOf(notes), "of another program");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "notes.txt", "old.edl"}));
+    std::vector<std::string> replacing = words;
+    replacing.emplace_back("--overwrite");
+    EXPECT_EQ(runCadrelDisturbedAt("reading new.edl", replacing, disturb).status, 0);
+    EXPECT_NE(contentOf(notes), "of another program");
+}
+
 TEST(Notes, RefusesAFormThatItDoesNotKnow)
 {
     const Cuts film(oldCut(), newCut());
