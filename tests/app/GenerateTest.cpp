@@ -391,11 +391,7 @@ TEST(Generate, AFileThatComesUpDuringTheRunIsNotOverwritten)
     const std::vector<std::string> inputs{"new.edl", "old.edl"};
     const auto requireKept = [&](const Outcome& outcome, const std::string& name) {
         EXPECT_EQ(outcome.status, 1);
-        EXPECT_NE(outcome.out.find(name +
-                                   ": another program has written it meanwhile; look at what it has written, and "
-                                   "run again"),
-                  std::string::npos)
-            << outcome.out;
+        EXPECT_NE(outcome.out.find(name + ": exists already; give --overwrite"), std::string::npos) << outcome.out;
         EXPECT_EQ(contentOf(film.folder / name), "of another program");
         EXPECT_EQ(film.folder.names().size(), inputs.size() + 1);
         std::filesystem::remove(film.folder / name);

@@ -9,6 +9,7 @@
 #include <cstddef>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
+#include <regex>
 #include <sstream>
 
 namespace {
@@ -348,6 +349,25 @@ TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_NE(outcome.out.find("   1  01:00:00:00  replace 00:00:30:00 by 00:00:10:00"), std::string::npos)
         << outcome.out;
+}
+
+TEST(Notes, DropFrameShowsInASemicolonForPeopleAlone)
+{
+    const Cuts film(oldCut(), newCut());
+    const std::regex withColons(R"(\d\d:\d\d:\d\d:\d\d)");
+    const std::regex withSemicolon(R"(\d\d:\d\d:\d\d;\d\d)");
+    const std::vector<std::string> dropFrame{"--rate", "29.97 dfps"};
+
+    const std::string text = film.notes(dropFrame).out;
+
+    EXPECT_NE(text.find("01:00:10;00"), std::string::npos) << text;
+    EXPECT_FALSE(std::regex_search(text, withColons)) << text;
+    EXPECT_TRUE(std::regex_search(film.file(".html", dropFrame), withSemicolon));
+    // The columns of the table are for programs, the words in it for people.
+    EXPECT_TRUE(std::regex_search(film.file(".csv", dropFrame), withColons));
+    EXPECT_TRUE(std::regex_search(film.file(".json", dropFrame), withColons));
+    EXPECT_FALSE(std::regex_search(film.file(".json", dropFrame), withSemicolon));
+    EXPECT_FALSE(std::regex_search(film.notes({"--rate", "30 fps"}).out, withSemicolon));
 }
 
 TEST(Notes, AFileThatComesUpDuringTheRunIsNotOverwritten)
