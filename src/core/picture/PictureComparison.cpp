@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/keep/PictureComparison.h"
+#include "core/picture/PictureComparison.h"
 
 #include "core/edl/EventBase.h"
-#include "core/keep/PictureLine.h"
+#include "core/picture/PictureLine.h"
 
 #include <algorithm>
 #include <cmath>

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/keep/PictureNames.h"
+#include "core/picture/PictureNames.h"
 
 #include "core/edl/EventBase.h"
 #include "core/edl/MatchedName.h"
@@ -43,19 +43,19 @@ bool PictureNames::hasReadableSource(const EventBase& event, const Framerate& fr
            event.srcIn().isValid(framerate) && event.srcOut().isValid(framerate);
 }
 
-std::uint32_t PictureNames::numberOf(const EventBase& event, const Framerate& framerate)
+std::int32_t PictureNames::numberOf(const EventBase& event, const Framerate& framerate)
 {
-    return numberOf(textOf(event, framerate));
+    return m_numbers.numberOf(textOf(event, framerate));
 }
 
-std::uint32_t PictureNames::numberOfTransition(const EventBase& event, const EventBase* outgoing,
-                                               const Framerate& framerate)
+std::int32_t PictureNames::numberOfTransition(const EventBase& event, const EventBase* outgoing,
+                                              const Framerate& framerate)
 {
     std::string text = textOf(event, framerate);
     text += Separator + std::to_string(event.transitionType()) + ' ' + std::to_string(event.transitionDuration());
     if (outgoing != nullptr)
         text += Separator + textOf(*outgoing, framerate) + Separator + outgoing->lastSource().toString();
-    return numberOf(text);
+    return m_numbers.numberOf(text);
 }
 
 std::string PictureNames::textOf(const EventBase& event, const Framerate& framerate)
@@ -75,11 +75,6 @@ const std::string& PictureNames::matchedName(const std::string& name)
     if (known != m_matchedNames.end())
         return known->second;
     return m_matchedNames.emplace(name, m_versionPatterns.stripVersion(name)).first->second;
-}
-
-std::uint32_t PictureNames::numberOf(const std::string& text)
-{
-    return m_numbers.emplace(text, static_cast<std::uint32_t>(m_numbers.size())).first->second;
 }
 
 } // namespace cadrel::core

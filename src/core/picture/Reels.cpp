@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/keep/Reels.h"
+#include "core/picture/Reels.h"
 
 #include <algorithm>
 #include <cmath>

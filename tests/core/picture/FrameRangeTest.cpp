@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 
-#include "tests/core/keep/KeepFilm.h"
+#include "tests/core/picture/Film.h"
 
 #include <gtest/gtest.h>
 
@@ -40,6 +40,12 @@ TEST(FrameRange, WhatLiesWithinBoundsIsCutAtThem)
 
     EXPECT_EQ(linesOf(within({5, 41}, ranges)), (Lines{"5..10", "20..30", "40..41"}));
     EXPECT_EQ(linesOf(within({10, 20}, ranges)), Lines());
+}
+
+TEST(FrameRange, TheLengthOfRangesIsWithoutTheGapsBetweenThem)
+{
+    EXPECT_EQ(lengthOf(FrameRanges{{0, 10}, {20, 30}, {40, 41}}), 21);
+    EXPECT_EQ(lengthOf(FrameRanges()), 0);
 }
 
 } // namespace cadrel::tests

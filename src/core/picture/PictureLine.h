@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 #include "core/time/Framerate.h"
 
 #include <cstddef>
@@ -17,10 +17,10 @@ class PictureNames;
 
 /// One event's part in a picture. The source frame at a frame of the programme is `origin + frame * speed`.
 struct PictureLayer {
-    std::uint32_t material = 0; ///< by PictureNames
-    double speed = 0.0;         ///< signed; 0 stands still
-    double origin = 0.0;        ///< the source frame at frame 0 of the programme
-    std::uint32_t event = 0;    ///< the place of an event in the list, which plays no part in a comparison
+    std::int32_t material = 0; ///< by PictureNames
+    double speed = 0.0;        ///< signed; 0 stands still
+    double origin = 0.0;       ///< the source frame at frame 0 of the programme
+    std::uint32_t event = 0;   ///< the place of an event in the list, which plays no part in a comparison
 
     bool isSamePicture(const PictureLayer& other) const
     {

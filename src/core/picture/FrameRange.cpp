@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 
 #include <utility>
 
@@ -49,6 +49,14 @@ FrameRanges within(const FrameRange& bounds, const FrameRanges& ranges)
             inside.push_back(common);
     }
     return inside;
+}
+
+std::int32_t lengthOf(const FrameRanges& ranges)
+{
+    std::int32_t frames = 0;
+    for (const FrameRange& range : ranges)
+        frames += range.length();
+    return frames;
 }
 
 FrameRanges shiftedBy(std::int32_t frames, FrameRanges ranges)

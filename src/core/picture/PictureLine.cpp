@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/keep/PictureLine.h"
+#include "core/picture/PictureLine.h"
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/ProgrammePlace.h"
-#include "core/keep/PictureNames.h"
+#include "core/picture/PictureNames.h"
 
 #include <algorithm>
 #include <set>

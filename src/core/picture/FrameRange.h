@@ -49,6 +49,9 @@ FrameRanges without(const FrameRanges& ranges, const FrameRanges& taken);
 /// What of `ranges` lies in `bounds`, in no more time than that takes.
 FrameRanges within(const FrameRange& bounds, const FrameRanges& ranges);
 
+/// How many frames they hold.
+std::int32_t lengthOf(const FrameRanges& ranges);
+
 FrameRanges shiftedBy(std::int32_t frames, FrameRanges ranges);
 
 } // namespace cadrel::core

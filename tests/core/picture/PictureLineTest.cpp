@@ -1,11 +1,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "core/keep/PictureLine.h"
+#include "core/picture/PictureLine.h"
 
 #include "core/edl/EventBase.h"
-#include "core/keep/PictureComparison.h"
-#include "core/keep/PictureNames.h"
-#include "tests/core/keep/KeepFilm.h"
+#include "core/picture/PictureComparison.h"
+#include "core/picture/PictureNames.h"
+#include "core/settings/MatchBy.h"
+#include "tests/core/picture/Film.h"
 #include "tests/support/core/EdlReading.h"
 #include "tests/support/core/TestProject.h"
 

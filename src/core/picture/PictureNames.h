@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "core/picture/TextNumbers.h"
 #include "core/settings/VfxNameMatcher.h"
 
 #include <cstdint>
@@ -24,10 +25,10 @@ public:
 
     /// The number of the event's material. A SRC that can't be read or doesn't exist at the rate is part of it as a
     /// text, since no frames can be counted there.
-    std::uint32_t numberOf(const EventBase& event, const Framerate& framerate);
+    std::int32_t numberOf(const EventBase& event, const Framerate& framerate);
     /// The number of the picture while the event's transition lasts; `outgoing` is the event that it leads away from,
     /// null when the list doesn't tell.
-    std::uint32_t numberOfTransition(const EventBase& event, const EventBase* outgoing, const Framerate& framerate);
+    std::int32_t numberOfTransition(const EventBase& event, const EventBase* outgoing, const Framerate& framerate);
 
     /// Whether frames of the source can be counted.
     static bool hasReadableSource(const EventBase& event, const Framerate& framerate);
@@ -35,12 +36,11 @@ public:
 private:
     std::string textOf(const EventBase& event, const Framerate& framerate);
     const std::string& matchedName(const std::string& name);
-    std::uint32_t numberOf(const std::string& text);
 
     std::int32_t m_matchBy;
     VfxNameMatcher m_versionPatterns;
     std::unordered_map<std::string, std::string> m_matchedNames;
-    std::unordered_map<std::string, std::uint32_t> m_numbers;
+    TextNumbers m_numbers;
 };
 
 } // namespace cadrel::core
