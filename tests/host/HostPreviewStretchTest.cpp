@@ -483,7 +483,11 @@ TEST_P(HostPreviewStretchTest, LeavesACopyThatIsMovedWhenNothingFollowsItAnyMore
 
 // The begin of the clock.
 
-TEST(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHangsOver)
+class HostPreviewAtTheBeginOfTheClock : public AtEachOrigin {};
+
+INSTANTIATE_TEST_SUITE_P(Origins, HostPreviewAtTheBeginOfTheClock, testing::Values(0.0, 3600.0));
+
+TEST_P(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHangsOver)
 {
     using Spans = std::vector<Span>;
     struct Case {
@@ -494,15 +498,17 @@ TEST(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHan
     };
     // Of the clip, four frames stand before the source.
     for (const Case& at :
-         {Case{"00:00:00:00", "00:00:04:21", {0.0, 4.84}, 0.16}, Case{"00:00:00:03", "00:00:04:24", {0.0, 4.96}, 0.04},
-          Case{"00:00:00:04", "00:00:05:00", {0.0, 5.0}, 0.0}, Case{"00:00:00:05", "00:00:05:01", {0.04, 5.04}, 0.0}}) {
+         {Case{":00:00:00", ":00:04:21", {0.0, 4.84}, 0.16}, Case{":00:00:03", ":00:04:24", {0.0, 4.96}, 0.04},
+          Case{":00:00:04", ":00:05:00", {0.0, 5.0}, 0.0}, Case{":00:00:05", ":00:05:01", {0.04, 5.04}, 0.0}}) {
         SCOPED_TRACE(at.dstIn);
-        AdaptedHost host(0.0);
+        const auto clock = [](const char* time) { return (GetParam() == 0.0 ? "00" : "01") + std::string(time); };
+        AdaptedHost host(GetParam());
         const Node track = host.addTrack(TypeWord::Audio, u"DX");
         host.addClip(track, u"one", 10.0, 20.0);
         host.switchMarkersOff();
         host.settings().setIncludeOverhangingAudioEvents(true);
-        host.carryOver("00:00:10:04", "00:00:15:00", at.dstIn, at.dstOut);
+        host.carryOver(clock(":00:10:04").c_str(), clock(":00:15:00").c_str(), clock(at.dstIn).c_str(),
+                       clock(at.dstOut).c_str());
         const auto expectSpans = [&](const Spans& expected) {
             const auto events = standin::tests::childrenOf(*track);
             ASSERT_EQ(events.size(), expected.size());
@@ -521,9 +527,32 @@ TEST(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHan
         expectSpans({{10.0, 20.0}});
 
         host.conform();
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
         expectSpans({at.written});
         EXPECT_NEAR(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), at.sourceOffset, 1e-6);
     }
+}
+
+TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheBeginOfTheHostsTimeline)
+{
+    // Where the clock begins later than at 0, an event can lie before it.
+    AdaptedHost host(3600.0);
+    const Node track = host.addTrack(TypeWord::Audio, u"DX");
+    host.addClip(track, u"one", 10.0, 20.0);
+    host.switchMarkersOff();
+    host.settings().setCreateDestinationMarkers(GetParam() == 0.0);
+    host.carryOver("01:00:10:00", "01:00:20:00", "00:59:56:00", "01:00:06:00");
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(host.undoNames().back(), u"Preview");
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 10-20", "one 86400-86406"}));
+    host.adapter().setPreviewActive(false);
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    EXPECT_EQ(host.contentOf(track), Texts{"one 0-6"});
+    EXPECT_EQ(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), 4.0);
 }
 
 // Locks.

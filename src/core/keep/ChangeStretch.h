@@ -28,4 +28,7 @@ std::optional<ChangeStretch> changeStretchOf(const EventBase& event, const Frame
 /// What a change EDL carries, without healing, ascending by destination.
 std::vector<ChangeStretch> unhealedStretches(const EventList& changeEvents, const Framerate& framerate);
 
+/// The stretches with those joined that touch and have one shift.
+std::vector<ChangeStretch> joinedByShift(const std::vector<ChangeStretch>& stretches);
+
 } // namespace cadrel::core

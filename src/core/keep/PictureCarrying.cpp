@@ -6,6 +6,9 @@
 #include "core/edl/EventList.h"
 #include "core/keep/ChangeStretch.h"
 
+#include <algorithm>
+#include <utility>
+
 namespace cadrel::core {
 
 PictureCarrying::PictureCarrying(const PictureLine& oldLine, const PictureLine& newLine, const Reels& reels,
@@ -16,9 +19,11 @@ PictureCarrying::PictureCarrying(const PictureLine& oldLine, const PictureLine& 
 
 void PictureCarrying::run(const EventList& changeEvents, const Framerate& framerate)
 {
+    const std::vector<ChangeStretch> stretches = unhealedStretches(changeEvents, framerate);
     carryReelEnds();
+    carryLongerThanInPlace(stretches);
     carryInPlace();
-    carryChangeEvents(changeEvents, framerate);
+    carryChangeEvents(changeEvents, stretches, framerate);
     carryHoles();
 }
 
@@ -43,15 +48,36 @@ void PictureCarrying::carryReelEnds()
     }
 }
 
+// Between two changes a frame can show what its twin happened to show there. That is less than the stretch it goes along with,
+// while a stretch that the change EDL sends onto its twin is less than what is the same around it.
+void PictureCarrying::carryLongerThanInPlace(const std::vector<ChangeStretch>& stretches)
+{
+    std::vector<FrameRange> equal;
+    for (const FrameRange& reel : m_reels.ofNew()) {
+        for (const PicturePiece& piece : m_comparison.equalUnder(0, reel))
+            equal.push_back(piece.frames);
+    }
+    const FrameRanges inPlace = united(std::move(equal));
+    for (const ChangeStretch& stretch : joinedByShift(stretches)) {
+        const FrameRange& bounds = stretch.destination;
+        auto range = std::partition_point(inPlace.begin(), inPlace.end(),
+                                          [&bounds](const FrameRange& other) { return other.end <= bounds.start; });
+        for (; range != inPlace.end() && range->start < bounds.end; ++range) {
+            if (stretch.shift != 0 && bounds.length() > range->length())
+                carryEqual(stretch.shift, intersect(bounds, *range));
+        }
+    }
+}
+
 void PictureCarrying::carryInPlace()
 {
     for (const FrameRange& reel : m_reels.ofNew())
         carryEqual(0, reel);
 }
 
-void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const Framerate& framerate)
+void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const std::vector<ChangeStretch>& stretches,
+                                        const Framerate& framerate)
 {
-    const std::vector<ChangeStretch> stretches = unhealedStretches(changeEvents, framerate);
     // Of several layers that claim one frame, that one is right under which the whole picture is the same.
     for (const ChangeStretch& stretch : stretches)
         carryEqual(stretch.shift, stretch.destination, CarriedFrom::Cut);

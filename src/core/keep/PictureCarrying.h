@@ -9,14 +9,16 @@
 #include "core/time/Framerate.h"
 
 #include <optional>
+#include <vector>
 
 namespace cadrel::core {
 
-class EventBase;
 class EventList;
+struct ChangeStretch;
 
 /// Carries over what has a picture in both cuts: first what is equal from the start of a reel or up to its end, then what
-/// is equal at the same time, then what the change EDL tells, and last the holes between.
+/// is equal at the same time unless the change EDL carries it over within a longer stretch, then what the change EDL tells,
+/// and last the holes between.
 class PictureCarrying {
 public:
     PictureCarrying(const PictureLine& oldLine, const PictureLine& newLine, const Reels& reels,
@@ -34,8 +36,10 @@ private:
     };
 
     void carryReelEnds();
+    void carryLongerThanInPlace(const std::vector<ChangeStretch>& stretches);
     void carryInPlace();
-    void carryChangeEvents(const EventList& changeEvents, const Framerate& framerate);
+    void carryChangeEvents(const EventList& changeEvents, const std::vector<ChangeStretch>& stretches,
+                           const Framerate& framerate);
     void carryHoles();
     void carryEqual(std::int32_t shift, const FrameRange& bounds);
     void carryEqual(std::int32_t shift, const FrameRange& bounds, CarriedFrom from);

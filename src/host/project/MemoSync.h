@@ -38,6 +38,7 @@ public:
         const Events& events;
         core::Framerate framerate; ///< of their timecodes
         double offset;             ///< how much later than its destination each one stands, in seconds
+        double begin;              ///< of the host's timeline, before which nothing stands, on the project's clock
         double moved = 0.0;        ///< how far the time origin has moved since they were written, in seconds
     };
 

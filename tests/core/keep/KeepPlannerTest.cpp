@@ -149,6 +149,34 @@ TEST_F(KeepPlannerTest, AfterOneChangeNoFrameStaysWhereItsTwinHappenedToStand)
     EXPECT_EQ(hullOf(plan), "1070..1190");
 }
 
+TEST_F(KeepPlannerTest, BetweenTwoChangesNoFrameStaysWhereItsTwinHappenedToStandEither)
+{
+    const Film before =
+        Film().at(1000).shot("X", 0, 70).shot("A", 0, 30).shot("B", 0, 20).shot("A", 20, 40).shot("C", 0, 60);
+    const Film after = before.withInsertBefore(4, "M", 10).withInsertBefore(1, "N", 30);
+
+    const KeepPlan plan = planFor(before, after);
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1070..1160 to 1100..1190: cut", "1160..1220 to 1200..1260: cut"}));
+}
+
+TEST_F(KeepPlannerTest, WhatIsEqualAtTheSameTimeStaysUnlessTheChangeEdlCarriesALongerStretch)
+{
+    const Film before =
+        Film().at(1000).shot("S", 0, 5).shot("A", 0, 10).shot("T", 0, 5).shot("A", 0, 11).shot("U", 0, 5);
+    const auto planWith = [&](std::int32_t length, const char* srcOut, const char* dstOut) {
+        const Film after = Film().at(1000).shot("V", 0, 5).shot("A", 0, length).shot("W", 0, 31 - length);
+        EventList changes;
+        changes.add(makeEvent("A", "00:17:00:00", srcOut, "00:16:45:00", dstOut));
+        return KeepPlanner(contextWith()).plan(before.list(), after.list(), changes);
+    };
+
+    EXPECT_EQ(linesOf(planWith(10, "00:17:10:00", "00:16:55:00").untouched), Lines());
+    EXPECT_EQ(linesOf(planWith(10, "00:17:10:00", "00:16:55:00").events),
+              (Lines{"1005..1015 to 1005..1015: unchanged"}));
+    EXPECT_EQ(linesOf(planWith(11, "00:17:11:00", "00:16:56:00").events), (Lines{"1020..1031 to 1005..1016: cut"}));
+}
+
 TEST_F(KeepPlannerTest, AFreezeGoesOnWithTheShotBeforeIt)
 {
     const Film before = Film().at(1000).shot("A", 0, 100).freeze("F", 7, 20).shot("B", 0, 50);
