@@ -1,3 +1,5 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+
 # Each target does all its own set-up: it installs what is missing, configures and builds.
 #
 #   make run            carries the sound of the example reel over to its new cut, into build/run

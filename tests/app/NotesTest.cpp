@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 #include <map>
 #include <nlohmann/json.hpp>
+#include <regex>
 #include <sstream>
 
 namespace {
@@ -432,6 +433,46 @@ TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_NE(outcome.out.find("   1  01:00:00:00  replace 00:00:30:00 by 00:00:10:00"), std::string::npos)
         << outcome.out;
+}
+
+TEST(Notes, DropFrameShowsInASemicolonForPeopleAlone)
+{
+    const Cuts film(oldCut(), newCut());
+    const std::regex withColons(R"(\d\d:\d\d:\d\d:\d\d)");
+    const std::regex withSemicolon(R"(\d\d:\d\d:\d\d;\d\d)");
+    const std::vector<std::string> dropFrame{"--rate", "29.97 dfps"};
+
+    const std::string text = film.notes(dropFrame).out;
+
+    EXPECT_NE(text.find("01:00:10;00"), std::string::npos) << text;
+    EXPECT_FALSE(std::regex_search(text, withColons)) << text;
+    EXPECT_TRUE(std::regex_search(film.file(".html", dropFrame), withSemicolon));
+    // The columns of the table are for programs, the words in it for people.
+    EXPECT_TRUE(std::regex_search(film.file(".csv", dropFrame), withColons));
+    EXPECT_TRUE(std::regex_search(film.file(".json", dropFrame), withColons));
+    EXPECT_FALSE(std::regex_search(film.file(".json", dropFrame), withSemicolon));
+    EXPECT_FALSE(std::regex_search(film.notes({"--rate", "30 fps"}).out, withSemicolon));
+}
+
+TEST(Notes, AFileThatComesUpDuringTheRunIsNotOverwritten)
+{
+    const std::string shots = manyShots(20000);
+    const TempFolder folder;
+    const std::string notes = folder / "notes.txt";
+    const std::vector<std::string> words{
+        "notes", "--old", folder.write("old.edl", shots), "--new", folder.write("new.edl", shots), "-o", notes};
+    const auto disturb = [&] { writeFile(notes, "of another program"); };
+
+    const Outcome outcome = runCadrelDisturbedAt("reading new.edl", words, disturb);
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_NE(outcome.out.find(notes + ": another program has written it meanwhile"), std::string::npos) << outcome.out;
+    EXPECT_EQ(contentOf(notes), "of another program");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "notes.txt", "old.edl"}));
+    std::vector<std::string> replacing = words;
+    replacing.emplace_back("--overwrite");
+    EXPECT_EQ(runCadrelDisturbedAt("reading new.edl", replacing, disturb).status, 0);
+    EXPECT_NE(contentOf(notes), "of another program");
 }
 
 TEST(Notes, RefusesAFormThatItDoesNotKnow)
