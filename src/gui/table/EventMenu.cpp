@@ -50,12 +50,14 @@ EventMenu::Item healingMenu(const EventList& list, const EventList& newList, con
 
 EventMenu::Item extendMenu(const EventList& list, const std::shared_ptr<core::EventBase>& event)
 {
-    EventMenu::Item menu = {EventMenu::Separator, translated(L"Extend Event"), true, {}};
-    for (const auto& [id, text] : {std::pair(EventMenu::ExtendPrevious, L"Until Previous Event"),
-                                   std::pair(EventMenu::ExtendNext, L"Until Next Event"),
-                                   std::pair(EventMenu::ExtendBoth, L"Until Previous and Next Event")})
-        menu.children.push_back({id, translated(text), canExtend(id, list, event), {}});
-    return menu;
+    const bool toPrevious = list.canExtendEvent(event, true);
+    const bool toNext = list.canExtendEvent(event, false);
+    return {EventMenu::Separator,
+            translated(L"Extend Event"),
+            true,
+            {{EventMenu::ExtendPrevious, translated(L"Until Previous Event"), toPrevious, {}},
+             {EventMenu::ExtendNext, translated(L"Until Next Event"), toNext, {}},
+             {EventMenu::ExtendBoth, translated(L"Until Previous and Next Event"), toPrevious && toNext, {}}}};
 }
 
 } // namespace
