@@ -33,6 +33,7 @@ protected:
     {
         m_edits.addListener(this);
         m_table.setBounds(0, 0, 900, 240);
+        m_table.setVisible(true);
     }
     ~ShownTable() override { m_edits.removeListener(this); }
 
