@@ -169,9 +169,9 @@ void EventTableModel::setHighlight(const Events& events)
 
 bool EventTableModel::isInView(int row) const
 {
-    const juce::Range<int> view = m_table->getViewport()->getViewArea().getVerticalRange();
-    const juce::Rectangle<int> place = m_table->getRowPosition(row, false).withY(row * m_table->getRowHeight());
-    return view.contains(place.getVerticalRange());
+    const int height = m_table->getRowHeight();
+    const juce::Range<int> place(row * height, (row + 1) * height);
+    return m_table->getViewport()->getViewArea().getVerticalRange().contains(place);
 }
 
 EventTableModel::Place EventTableModel::place() const
@@ -395,7 +395,7 @@ void EventTableModel::menuAnswered(int id, const std::vector<std::weak_ptr<Event
     for (const auto& event : offered)
         events.push_back(event.lock());
     // Another selection would be another menu.
-    if (id == EventMenu::Separator || events != getSelectedEvents())
+    if (events != getSelectedEvents() || !EventMenu::allows(id, *m_list, m_dataModel.newEdl(), events))
         return;
     if (id == EventMenu::Edit)
         requestEdit(events.front(), position);
@@ -408,7 +408,7 @@ void EventTableModel::menuAnswered(int id, const std::vector<std::weak_ptr<Event
 void EventTableModel::edit(int id, int row)
 {
     const Events events = getSelectedEvents();
-    if (!EventMenu::allows(id, *m_list, m_dataModel.newEdl(), events))
+    if (events.empty())
         return;
     const Life life = m_life;
     EventEdits::stopPreview(m_dataModel, m_engine);

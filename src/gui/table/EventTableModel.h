@@ -126,7 +126,7 @@ private:
                       int row);
     juce::Point<int> screenPositionOf(int row) const;
     void requestEdit(const std::shared_ptr<core::EventBase>& event, juce::Point<int> position);
-    /// Carries out an edit of the selected events. `row` is the one that was clicked or selected last.
+    /// Carries out an edit that is allowed for the selected events. `row` is the one that was clicked or selected last.
     void edit(int id, int row);
     /// Whether the edit may go on after a call of the host.
     bool mayGoOn(const Life& life, const Events& events) const;

@@ -58,11 +58,13 @@ protected:
         m_model = std::make_unique<gui::EventTableModel>(m_table, list(), m_dataModel);
         m_model->setEngine(&m_edits.engine);
         m_model->addListener(this);
-        m_model->setMenuPresenter([this](juce::PopupMenu& menu, juce::Point<int> position, auto chosen) {
-            m_menuText = textOf(menu);
-            m_menuPosition = position;
-            m_choose = std::move(chosen);
-        });
+        if (!m_showsMenus) {
+            m_model->setMenuPresenter([this](juce::PopupMenu& menu, juce::Point<int> position, auto chosen) {
+                m_menuText = textOf(menu);
+                m_menuPosition = position;
+                m_choose = std::move(chosen);
+            });
+        }
         m_edits.steps.clear();
         return *m_model;
     }
@@ -145,6 +147,7 @@ protected:
     gui::EventTable m_table{"Change Table List Box"};
     std::unique_ptr<gui::EventTableModel> m_model;
     bool m_reloads = true;
+    bool m_showsMenus = false; ///< else a menu is only written down
 
     Steps m_steps; ///< what the table tells
     std::function<void()> m_onSelection;
