@@ -24,6 +24,9 @@ const std::set<std::string> NotTranslated = {
     "Overlap in ", "Audio snippet in ", "Automation warning in ", "Event: ", "INVALID!",
 };
 
+/// What a German sound editor calls so too.
+const std::set<std::string> SameInGerman = {"Cadrel", "SRC IN", "SRC OUT", "DST IN", "DST OUT", "Normal"};
+
 /// The wide texts of the sources that hold a letter: all that the user reads in the host goes out in this form.
 std::set<std::string> textsOfTheSources()
 {
@@ -69,7 +72,6 @@ TEST(TranslationTable, IsReadByTheHost)
     translations->setLanguage("de");
     for (const std::string& text : textsOfTheTable()) {
         const std::u16string source = standin::toUtf16(text);
-        // All but the product's own name are other words in German.
-        EXPECT_EQ(source == translations->translate(source.c_str()), text == "Cadrel") << text;
+        EXPECT_EQ(source == translations->translate(source.c_str()), SameInGerman.contains(text)) << text;
     }
 }
