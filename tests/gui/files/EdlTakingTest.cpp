@@ -182,6 +182,15 @@ TEST_F(EdlTakingTest, AsksAboutDropFrameAgainstNonDropAtThirty)
     EXPECT_EQ(messages().size(), 1U);
 }
 
+TEST_F(EdlTakingTest, AsksNothingWhereTheProjectDoesNotSayItsKindOfTimecode)
+{
+    const TestProject project(Framerate(30, -1));
+
+    take({write("a.edl", "FCM: NON-DROP FRAME\n" + withFrame("29"))});
+
+    EXPECT_EQ(messages(), Messages{});
+}
+
 TEST_F(EdlTakingTest, KnowsDropFrameByItsSemicolons)
 {
     const TestProject project(Framerate(30, true, 0));

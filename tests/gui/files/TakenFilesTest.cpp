@@ -247,6 +247,14 @@ TEST_F(TakenFilesTest, AllowsEveryOffsetWithoutAValidEvent)
     EXPECT_EQ(textOf(m_taken.shifted(ListSide::Destination, earlier("05:00:00:00"))), "none");
 }
 
+TEST_F(TakenFilesTest, LeavesAnOffsetOfNothingAsItIs)
+{
+    take("a.edl", edlLine("001", "00:00:00:00 23:59:59:24 00:00:00:00 23:59:59:24"));
+
+    EXPECT_EQ(textOf(m_taken.bounded(ListSide::Destination, later("00:00:00:00"))), "+00:00:00:00");
+    EXPECT_EQ(textOf(m_taken.bounded(ListSide::Destination, earlier("00:00:00:00"))), "-00:00:00:00");
+}
+
 TEST_F(TakenFilesTest, CountsAnOffsetInFramesOfDropFrameTimecode)
 {
     const TestProject project(Framerate(30, true, 1));
@@ -351,10 +359,13 @@ TEST_F(TakenFilesTest, KeepsWhatWasTakenUnshifted)
 
     m_taken.appendTo(m_model, later("01:00:00:00"), {}, L"/reels");
     m_taken.appendTo(m_model, later("02:00:00:00"), {}, L"/reels");
+    m_taken.appendTo(m_model, {}, later("01:00:00:00"), L"/reels");
 
     EXPECT_EQ(range(ListSide::Destination), "01:00:00:00 01:00:05:00");
+    EXPECT_EQ(range(ListSide::Source), "10:00:00:00 10:00:05:00");
     EXPECT_EQ(timecodesOfAll(m_model.oldEdl()), (Texts{"10:00:00:00 10:00:05:00 02:00:00:00 02:00:05:00",
-                                                       "10:00:00:00 10:00:05:00 03:00:00:00 03:00:05:00"}));
+                                                       "10:00:00:00 10:00:05:00 03:00:00:00 03:00:05:00",
+                                                       "11:00:00:00 11:00:05:00 01:00:00:00 01:00:05:00"}));
 }
 
 TEST_F(TakenFilesTest, ChangesNothingWhenOneListWouldLeaveTheDay)
