@@ -24,8 +24,9 @@ const std::set<std::string> NotTranslated = {
     "%s", "Overlap in ", "Audio snippet in ", "Automation warning in ", "Event: ", "INVALID!",
 };
 
-/// Words that the language of film has everywhere.
-const std::set<std::string> SameInGerman = {"Cadrel", "OK", "IN", "OUT", "SRC IN", "SRC OUT", "DST IN", "DST OUT"};
+/// What a German sound editor calls so too.
+const std::set<std::string> SameInGerman = {"Cadrel",  "OK",     "IN",      "OUT",   "SRC IN",
+                                            "SRC OUT", "DST IN", "DST OUT", "Normal"};
 
 /// The wide texts of the sources that hold a letter: all that the user reads in the host goes out in this form.
 std::set<std::string> textsOfTheSources()
