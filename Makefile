@@ -28,6 +28,7 @@ run:
 
 test:
 	@cmake/build.sh $(PRESET)
+	@cmake/install-packages.sh tests
 	ctest --test-dir build/$(PRESET) --parallel $$(nproc) --output-on-failure --no-tests=error \
 	    --output-junit "$(CURDIR)/build/$(PRESET)/tests.xml"
 

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "app/edl/EventWords.h"
 #include "app/notes/NotesText.h"
 #include "app/notes/NotesWording.h"
 #include "core/edl/EventBase.h"
@@ -58,17 +59,15 @@ private:
         ordered_json doubts = ordered_json::array();
         for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
             const core::EventBase& event = events.at(static_cast<std::size_t>(doubtful.event));
-            ordered_json flaws = ordered_json::array();
-            for (const std::int32_t flaw : event.flaws())
-                flaws.push_back(wordOfFlaw(flaw));
             ordered_json doubt = shotJson(&event);
             doubt["doubt"] = wordOf(doubtful.doubt);
-            doubt["flaws"] = std::move(flaws);
+            doubt["flaws"] = flawWordsOf(event);
             doubts.push_back(std::move(doubt));
         }
         return {{"files", isNew ? m_document.cuts.newNames : m_document.cuts.oldNames},
                 {"events", events.size()},
                 {"invalid", events.countInvalid()},
+                {"unread", toJson(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread)},
                 {"doubts", std::move(doubts)}};
     }
 
@@ -193,9 +192,7 @@ private:
                 {"srcIn", shot->srcIn().toString()},
                 {"srcOut", shot->srcOut().toString()},
                 {"speed", shot->signedSpeed()},
-                {"transition", shot->transitionType() == core::TransitionType::Wipe ? "wipe"
-                               : shot->isTransition()                               ? "dissolve"
-                                                                                    : "cut"},
+                {"transition", transitionWordOf(*shot)},
                 {"transitionFrames", shot->transitionDuration()},
                 {"edlFile", shot->edlFileName()}};
     }

@@ -145,8 +145,8 @@ TEST(Generate, JsonTellsTheEventsAndTheSummary)
     const json document = film.generateAsJson({"-o", film.folder / "change.edl"});
 
     ASSERT_EQ(document.at("events").size(), 3U);
-    EXPECT_EQ(document.at("events").at(1), json::parse(R"({"number": 2, "kind": 0, "roll": "A002",
-        "clip": "TWO", "transition": 0, "duration": 0, "srcIn": "01:00:12:00", "srcOut": "01:00:20:00",
+    EXPECT_EQ(document.at("events").at(1), json::parse(R"({"number": 2, "kind": "plain", "roll": "A002",
+        "clip": "TWO", "transition": "cut", "duration": 0, "srcIn": "01:00:12:00", "srcOut": "01:00:20:00",
         "dstIn": "01:00:10:00", "dstOut": "01:00:18:00", "speed": 1.0, "vfx": false, "flaws": [], "edlFile": "",
         "members": []})"));
     EXPECT_EQ(document.at("rate"), "24 fps");
@@ -168,7 +168,7 @@ TEST(Generate, TouchingNeighboursAreHealed)
     ASSERT_EQ(timesOf(document.at("events")),
               (std::vector<std::string>{"01:00:00:00-01:00:30:00>01:00:00:00-01:00:30:00"}));
     const json& healed = document.at("events").at(0);
-    EXPECT_EQ(healed.at("kind"), 1);
+    EXPECT_EQ(healed.at("kind"), "healed");
     EXPECT_EQ(healed.at("roll"), "Healed Event 001");
     EXPECT_EQ(timesOf(healed.at("members")),
               (std::vector<std::string>{"01:00:00:00-01:00:10:00>01:00:00:00-01:00:10:00",

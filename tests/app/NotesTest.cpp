@@ -1,13 +1,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/Film.h"
-#include "tests/app/JsonSchema.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/support/TreePaths.h"
 
 #include <algorithm>
 #include <cstddef>
 #include <gtest/gtest.h>
+#include <map>
 #include <nlohmann/json.hpp>
 #include <sstream>
 
@@ -23,6 +23,13 @@ std::vector<std::string> linesOf(const std::string& text)
     for (std::string line; std::getline(stream, line);)
         lines.push_back(line);
     return lines;
+}
+
+/// The characters of a text in UTF-8.
+std::ptrdiff_t columnsOf(const std::string& text)
+{
+    return std::count_if(text.begin(), text.end(),
+                         [](char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U; });
 }
 
 /// An old and a new cut in a folder of their own.
@@ -107,7 +114,7 @@ TEST(Notes, NoLineOfTheTextIsWiderThan80Columns)
     const Outcome outcome = runCadrel(reel3({"--feet"}));
 
     for (const std::string& line : linesOf(outcome.out))
-        EXPECT_LE(line.size(), 80U) << line;
+        EXPECT_LE(columnsOf(line), 80) << line;
 }
 
 TEST(Notes, LongNamesMakeNoLineWider)
@@ -169,31 +176,6 @@ TEST(Notes, ACsvTextIsNoFormulaAndKeepsItsQuotes)
     const std::string csv = film.file(".csv");
 
     EXPECT_NE(csv.find(",B002,\"'=1+\"\"A\"\"\","), std::string::npos) << csv;
-}
-
-TEST(Notes, TheJsonKeepsToItsSchema)
-{
-    const JsonSchema schema(json::parse(contentOf(treePath("docs/notes.schema.json"))));
-    const Cuts film(oldCut(), newCut());
-
-    EXPECT_EQ(schema.faultOf(json::parse(film.file(".json", {"--feet"}))), "");
-    EXPECT_EQ(schema.faultOf(reel3Json()), "");
-}
-
-TEST(Notes, TheSchemaRefusesWhatIsNoNotes)
-{
-    const JsonSchema schema(json::parse(contentOf(treePath("docs/notes.schema.json"))));
-    json notes = reel3Json();
-
-    json missing = notes;
-    missing.erase("rate");
-    json surplus = notes;
-    surplus["more"] = 1;
-    json number = notes;
-    number["reels"][0]["rows"][1]["action"] = 0;
-
-    for (const json& wrong : {missing, surplus, number})
-        EXPECT_NE(schema.faultOf(wrong), "");
 }
 
 TEST(Notes, TheFiguresOfTheExampleAreThoseOfItsListOfChanges)
@@ -311,6 +293,93 @@ TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_EQ(countOf("old.edl, event 10 (S001): no picture", outcome.out), 5) << outcome.out;
     EXPECT_NE(outcome.out.find("Old cut, 2 further events: no picture"), std::string::npos) << outcome.out;
+}
+
+/// A text with a single blank wherever there are blanks or line ends.
+std::string unbroken(const std::string& text)
+{
+    std::istringstream stream(text);
+    std::string all;
+    for (std::string word; stream >> word;)
+        all.append(all.empty() ? "" : " ").append(word);
+    return all;
+}
+
+std::string textOfPdf(const std::string& file)
+{
+    const Outcome outcome = runProgram("pdftotext", {"-layout", file, "-"});
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    return outcome.out;
+}
+
+/// The lines of the last block, as the JSON has them.
+std::vector<std::string> remarksIn(const json& notes)
+{
+    const json& healed = notes.at("healed");
+    std::vector<std::string> lines{std::to_string(healed.at("events").get<int>()) +
+                                   " event of the change EDL healed from " +
+                                   std::to_string(healed.at("members").get<int>())};
+    for (const char* const side : {"old", "new"}) {
+        std::map<std::string, int> counts;
+        for (const json& doubt : notes.at(side).at("doubts")) {
+            if (++counts[doubt.at("doubt")] <= 5)
+                lines.push_back(doubt.at("edlFile").get<std::string>() + ", event " +
+                                std::to_string(doubt.at("event").get<int>()) + " (");
+        }
+        int unread = 0;
+        for (const json& line : notes.at(side).at("unread")) {
+            if (++unread <= 5)
+                lines.push_back(line.at("file").get<std::string>() + ", line " +
+                                std::to_string(line.at("line").get<int>()) + " " +
+                                line.at("problem").get<std::string>() + ": \"");
+        }
+        if (unread > 5)
+            lines.push_back(std::string(side == std::string("old") ? "Old" : "New") + " cut, " +
+                            std::to_string(unread - 5) + " further line");
+    }
+    return lines;
+}
+
+TEST(Notes, WhatIsHealedDoubtedAndNotReadStandsInEveryForm)
+{
+    std::string broken;
+    for (int line = 0; line < 7; ++line)
+        broken += "02" + std::to_string(line) + "  A004  V  C  12:00:00:00 12:00:01:00 01:00:30:00\n";
+    const std::string reversed = cut("009", "A009", "10:00:05:00 10:00:04:00", "01:00:40:00 01:00:41:00");
+    const std::string sound = "010  S001  A  C  10:00:00:00 10:00:01:00 01:00:00:00 01:00:01:00\n";
+    const Cuts film(oldCut() + broken + cut("008", "AX", "10:00:00:00 10:00:01:00", "01:00:30:00 01:00:31:00"),
+                    newCut() + "021  A004  V  C  12:00:00:00 12:00:01:00 01:00:30:00\n" +
+                        cut("008", "AX", "10:00:00:00 10:00:01:00", "01:00:32:00 01:00:33:00") + reversed + sound);
+
+    const json notes = json::parse(film.file(".json"));
+    const std::string pdf = film.folder / "notes.pdf";
+    film.file(".pdf");
+    const std::string text = film.notes().out;
+    std::string html = film.file(".html");
+    for (std::size_t at = 0; (at = html.find("&quot;", at)) != std::string::npos;)
+        html.replace(at, 6, 1, '"');
+
+    ASSERT_EQ(notes.at("old").at("unread").size(), 7U);
+    // The head of the old cut has two lines, and each of its three shots has two.
+    EXPECT_EQ(notes.at("old").at("unread")[0],
+              (json{{"file", "old.edl"},
+                    {"line", 8},
+                    {"problem", "misses a field and isn't read"},
+                    {"text", "020  A004  V  C  12:00:00:00 12:00:01:00 01:00:30:00"}}));
+    ASSERT_EQ(notes.at("new").at("unread").size(), 1U);
+    EXPECT_EQ(notes.at("old").at("doubts").size(), 1U);
+    EXPECT_EQ(notes.at("new").at("doubts").size(), 3U);
+    // THREE and the shot after it.
+    EXPECT_EQ(notes.at("healed"), (json{{"events", 1}, {"members", 2}, {"bridgedGaps", 0}}));
+    const std::vector<std::string> remarks = remarksIn(notes);
+    // Healing, a doubt and six lines of the old cut, three doubts and a line of the new one.
+    EXPECT_EQ(remarks.size(), 12U);
+    for (const std::string& form : {text, html, textOfPdf(pdf)}) {
+        for (const std::string& remark : remarks)
+            EXPECT_NE(unbroken(form).find(remark), std::string::npos) << remark << "\n" << form;
+    }
+    for (const std::string& line : linesOf(text))
+        EXPECT_LE(columnsOf(line), 80) << line;
 }
 
 TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)

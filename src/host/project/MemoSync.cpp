@@ -124,7 +124,10 @@ std::vector<MemoSync::Shown> MemoSync::stretchesOf(const Previewed& previewed)
                                  event.dstOut().toSeconds(framerate) + offset};
         const double srcIn = event.srcIn().toSeconds(framerate) + moved;
         const double srcOut = event.srcOut().toSeconds(framerate) + moved;
-        const std::vector<SecondsRange> pieces = later.add(whole);
+        const SecondsRange written{std::max(whole.start, previewed.begin + previewed.offset), whole.end};
+        if (isEmpty(written))
+            continue;
+        const std::vector<SecondsRange> pieces = later.add(written);
         for (auto piece = pieces.rbegin(); piece != pieces.rend(); ++piece) {
             const SecondsRange source{srcIn + (piece->start - whole.start),
                                       std::min(srcIn + (piece->end - whole.start), srcOut)};
@@ -198,6 +201,11 @@ void MemoSync::remember(const Track& memos, const Previewed& previewed)
             std::ranges::transform(shown.copies, std::back_inserter(found[shown.event]), memoOf);
     }
     m_remembered = std::move(found);
+}
+
+std::vector<HostEvent> MemoSync::adrift(const Track& memos, const Previewed& previewed)
+{
+    return previewOf(PlacedMemos(memos), previewed).adrift;
 }
 
 void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTransaction& transaction)

@@ -38,6 +38,7 @@ public:
         const Events& events;
         core::Framerate framerate; ///< of their timecodes
         double offset;             ///< how much later than its destination each one stands, in seconds
+        double begin;              ///< of the host's timeline, before which nothing stands, on the project's clock
         double moved = 0.0;        ///< how far the time origin has moved since they were written, in seconds
     };
 
@@ -50,6 +51,8 @@ public:
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.
     void remember(const Track& memos, const Previewed& previewed);
     void forget() { m_remembered.clear(); }
+    /// The memos after the preview offset that stand in no stretch of the preview, and so have no part in what is followed.
+    static std::vector<HostEvent> adrift(const Track& memos, const Previewed& previewed);
 
 private:
     /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's

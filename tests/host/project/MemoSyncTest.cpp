@@ -796,6 +796,29 @@ TEST_P(MemoSyncTest, BehindTheMaterialOfASlowerEventAMemoStandsAtItsEnd)
     EXPECT_EQ(film(), Content{"late 20"});
 }
 
+TEST_P(MemoSyncTest, OfAnEventThatReachesToBeforeTheTimelineWhatIsShownIsFollowed)
+{
+    if (GetParam() == 0.0)
+        return; // There is no timecode before it.
+    addMemo(u"cue", 12.0);
+    addMemo(u"splash", 18.0);
+    const auto beforeTheClock = event("01:00:10:00", "01:00:20:00", "00:59:55:00", "01:00:05:00");
+    preview({event("01:00:40:00", "01:00:50:00", "00:59:40:00", "00:59:50:00"), beforeTheClock});
+    ASSERT_EQ(copies(), Content{"splash 3"});
+
+    move(copyOf(u"splash"), 2.0);
+    EXPECT_EQ(film(), (Content{"cue 12", "splash 17"}));
+    addCopy(u"gunshot", 1.0);
+    EXPECT_EQ(film(), (Content{"cue 12", "gunshot 16", "splash 17"}));
+
+    // Where nothing is known of the copies, their number tells.
+    host.adapter.model().setPreviewActive(false);
+    host.adapter.onProjectChanged();
+    host.adapter.model().setPreviewActive(true);
+    rename(copyOf(u"splash"), u"big splash");
+    EXPECT_EQ(film(), (Content{"cue 12", "gunshot 16", "big splash 17"}));
+}
+
 TEST_P(MemoSyncTest, EventsThatWriteNothingArePassedOver)
 {
     addMemo(u"cue", 12.0);
