@@ -33,8 +33,8 @@ void Sheet::paint(juce::Graphics& graphics)
 
 bool Sheet::keyPressed(const juce::KeyPress& key)
 {
-    const bool isReturn = key.isKeyCode(juce::KeyPress::returnKey);
-    const bool isEscape = key.isKeyCode(juce::KeyPress::escapeKey);
+    const bool isReturn = key == juce::KeyPress(juce::KeyPress::returnKey);
+    const bool isEscape = key == juce::KeyPress(juce::KeyPress::escapeKey);
     if (!isReturn && !isEscape)
         return false;
     guardUser([&] { isReturn ? confirm() : cancel(); });
@@ -49,8 +49,9 @@ void Sheet::visibilityChanged()
 void Sheet::showOver()
 {
     m_isOver = true;
+    const Component* const parent = getParentComponent();
+    m_formerFocus = parent && parent->hasKeyboardFocus(true) ? getCurrentlyFocusedComponent() : nullptr;
     if (m_beneath) {
-        m_formerFocus = m_beneath->hasKeyboardFocus(true) ? getCurrentlyFocusedComponent() : m_beneath.getComponent();
         m_beneath->setEnabled(false);
         m_beneath->setInterceptsMouseClicks(false, false);
     }

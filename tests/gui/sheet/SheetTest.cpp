@@ -117,6 +117,17 @@ TEST_F(SheetTest, TakesTheFocusAndGivesItBack)
     EXPECT_EQ(focus(), "field");
 }
 
+TEST_F(SheetTest, GivesTheFocusBackToTheWindowItself)
+{
+    m_window.setName("window");
+    m_window.grabKeyboardFocus();
+    m_sheet.setVisible(true);
+
+    m_sheet.setVisible(false);
+
+    EXPECT_EQ(focus(), "window");
+}
+
 TEST_F(SheetTest, TakesNoFocusFromElsewhereWhenItGoes)
 {
     m_field.grabKeyboardFocus();
@@ -186,6 +197,8 @@ TEST_F(SheetTest, LetsOtherKeysGoOn)
     m_sheet.grabKeyboardFocus();
 
     EXPECT_FALSE(m_window.press(juce::KeyPress::F3Key));
+    EXPECT_FALSE(m_window.press(juce::KeyPress::returnKey, juce::ModifierKeys::ctrlModifier));
+    EXPECT_FALSE(m_window.press(juce::KeyPress::escapeKey, juce::ModifierKeys::altModifier));
 }
 
 TEST_F(SheetTest, TellsOfAFailure)
