@@ -106,19 +106,21 @@ void TcEditDialog::listChanged(const core::EventList& list)
 
 void TcEditDialog::resized()
 {
-    m_eventName.setBounds(13, 8, 250, 24);
-    m_line.setBounds(11, 34, 277, 1);
-    for (std::size_t place = 0; place < m_rows.size(); ++place) {
-        const int labelWidth = place < EventEdit::DstIn ? 80 : 104;
-        m_rows[place].label.setBounds(20, RowTops[place], labelWidth, RowHeight);
-        m_rows[place].tick.setBounds(126, RowTops[place], 30, RowHeight);
-        m_rows[place].input.setBounds(156, RowTops[place], 128, RowHeight);
-    }
-    m_motionSpeedLabel.setBounds(19, 216, 141, 24);
-    m_motionSpeedValue.setBounds(210, 216, 70, 24);
-    m_flaw.setBounds(19, 239, 270, 18);
-    m_applyButton.setBounds(66, 260, 80, 24);
-    m_cancelButton.setBounds(155, 260, 80, 24);
+    guardSystem([this] {
+        m_eventName.setBounds(13, 8, 250, 24);
+        m_line.setBounds(11, 34, 277, 1);
+        for (std::size_t place = 0; place < m_rows.size(); ++place) {
+            const int labelWidth = place < EventEdit::DstIn ? 80 : 104;
+            m_rows[place].label.setBounds(20, RowTops[place], labelWidth, RowHeight);
+            m_rows[place].tick.setBounds(126, RowTops[place], 30, RowHeight);
+            m_rows[place].input.setBounds(156, RowTops[place], 128, RowHeight);
+        }
+        m_motionSpeedLabel.setBounds(19, 216, 141, 24);
+        m_motionSpeedValue.setBounds(210, 216, 70, 24);
+        m_flaw.setBounds(19, 239, 270, 18);
+        m_applyButton.setBounds(66, 260, 80, 24);
+        m_cancelButton.setBounds(155, 260, 80, 24);
+    });
 }
 
 void TcEditDialog::buttonClicked(juce::Button* button)

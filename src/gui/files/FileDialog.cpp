@@ -141,17 +141,19 @@ void FileDialog::placeSide(Side& side, int top)
 
 void FileDialog::resized()
 {
-    const int middle = getWidth() / 2;
-    const int centre = getHeight() / 2;
-    m_title.setBounds(middle - 353, centre - 179, 472, RowHeight);
-    m_line.setBounds(middle - 349, centre - 152, 699, 1);
-    m_edlLabel.setBounds(middle - 350, centre - 129, 472, RowHeight);
-    m_openFilesButton.setBounds(middle + 266, centre - 127, 80, RowHeight);
-    m_fileList.setBounds(middle - 254, centre - 88, 600, 132);
-    placeSide(m_destination, centre + 60);
-    placeSide(m_source, centre + 101);
-    m_okButton.setBounds(middle + 177, centre + 100, 80, RowHeight);
-    m_cancelButton.setBounds(middle + 266, centre + 100, 80, RowHeight);
+    guardSystem([this] {
+        const int middle = getWidth() / 2;
+        const int centre = getHeight() / 2;
+        m_title.setBounds(middle - 353, centre - 179, 472, RowHeight);
+        m_line.setBounds(middle - 349, centre - 152, 699, 1);
+        m_edlLabel.setBounds(middle - 350, centre - 129, 472, RowHeight);
+        m_openFilesButton.setBounds(middle + 266, centre - 127, 80, RowHeight);
+        m_fileList.setBounds(middle - 254, centre - 88, 600, 132);
+        placeSide(m_destination, centre + 60);
+        placeSide(m_source, centre + 101);
+        m_okButton.setBounds(middle + 177, centre + 100, 80, RowHeight);
+        m_cancelButton.setBounds(middle + 266, centre + 100, 80, RowHeight);
+    });
 }
 
 void FileDialog::enablementChanged()
