@@ -1,3 +1,5 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+
 # What all targets of this tree share: the language, the warnings, the sanitizers and where the outputs go.
 
 set(CMAKE_CXX_STANDARD 20)

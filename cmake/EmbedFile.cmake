@@ -1,3 +1,5 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+
 # Writes a file as a C++ source with its bytes; see cadrel_embed.
 file(READ ${FILE} bytes HEX)
 string(REGEX REPLACE "(..)" "0x\\1," bytes "${bytes}")

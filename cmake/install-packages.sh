@@ -1,6 +1,8 @@
 #!/bin/sh
+# SPDX-License-Identifier: GPL-3.0-or-later
 # install-packages.sh WHAT: installs the Debian packages that a preset ("release", "debug", "asan", "fuzz"), a run of the
-# tests ("tests"), the pictures in docs ("pictures") or "format" needs. Does nothing where they are all there, and on systems other than Debian, where CMake says what it misses.
+# tests ("tests"), the pictures of change notes ("pictures") or "format" needs. Does nothing where they are all there, and on
+# systems other than Debian, where CMake says what it misses.
 set -eu
 
 needed="build-essential cmake libcli11-dev nlohmann-json3-dev libpugixml-dev juce-modules-source libgtest-dev librapidcheck-dev

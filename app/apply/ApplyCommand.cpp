@@ -492,7 +492,7 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
     facts.reportBackups = formerReport.names();
     std::optional<Output> report;
     if (Output::isFile(options.jsonFile)) {
-        report.emplace(options.jsonFile);
+        report.emplace(options.jsonFile, options.replacing.isAllowed);
         writeReport(*report, hosted.model(), ApplyJson(facts, clock));
         report->finish();
     }
@@ -512,7 +512,7 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
 void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyOptions& options)
 {
     if (Output::isStandardOutput(options.jsonFile)) {
-        Output output(options.jsonFile);
+        Output output(options.jsonFile, true);
         writeReport(output, facts.model, ApplyJson(facts, clock));
         output.place();
         return;

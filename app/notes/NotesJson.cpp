@@ -97,7 +97,8 @@ private:
     {
         if (!reel)
             return nullptr;
-        return {{"start", m_words.timecode(cut.reels()[*reel].timecodeStart)}, {"frames", cut.reels()[*reel].length}};
+        return {{"start", m_words.plainTimecode(cut.reels()[*reel].timecodeStart)},
+                {"frames", cut.reels()[*reel].length}};
     }
 
     void writeReel(std::size_t index, const NotesSink& sink) const
@@ -118,8 +119,8 @@ private:
     {
         const core::KeptStretch& kept = *entry.kept();
         return {{"row", "kept"},
-                {"oldIn", m_words.timecode(m_document.notes.oldTimecode(kept.oldStart))},
-                {"newIn", m_words.timecode(m_document.notes.newTimecode(kept.newStart))},
+                {"oldIn", m_words.plainTimecode(m_document.notes.oldTimecode(kept.oldStart))},
+                {"newIn", m_words.plainTimecode(m_document.notes.newTimecode(kept.newStart))},
                 {"frames", kept.length},
                 {"offsetFrames",
                  m_document.notes.newTimecode(kept.newStart) - m_document.notes.oldTimecode(kept.oldStart)}};
@@ -128,7 +129,7 @@ private:
     ordered_json placeJson(const core::WorkPlace& place) const
     {
         ordered_json json{{"reel", place.reel + 1},
-                          {"timecode", m_words.timecode(m_document.notes.timecodeOf(place))},
+                          {"timecode", m_words.plainTimecode(m_document.notes.timecodeOf(place))},
                           {"frame", place.frame}};
         if (m_document.showsFeet)
             json["feet"] = NotesWording::feet(place.frame);
@@ -145,7 +146,7 @@ private:
                           {"deleteFrames", step.removed},
                           {"insertFrames", step.inserted.length}};
         if (step.inserted.length > 0)
-            json["insertFrom"] = m_words.timecode(m_document.notes.newTimecode(step.inserted.start));
+            json["insertFrom"] = m_words.plainTimecode(m_document.notes.newTimecode(step.inserted.start));
         if (step.action == core::StepAction::Move) {
             json["from"] = placeJson(step.from);
             json["moveFrames"] = step.moved;
@@ -172,10 +173,10 @@ private:
         if (change.newShot != nullptr)
             json["newShot"] = shotJson(change.newShot);
         if (change.inOld)
-            json["old"] = {{"in", m_words.timecode(m_document.notes.oldTimecode(change.inOld->start))},
+            json["old"] = {{"in", m_words.plainTimecode(m_document.notes.oldTimecode(change.inOld->start))},
                            {"frames", change.inOld->length}};
         if (change.inNew)
-            json["new"] = {{"in", m_words.timecode(m_document.notes.newTimecode(change.inNew->start))},
+            json["new"] = {{"in", m_words.plainTimecode(m_document.notes.newTimecode(change.inNew->start))},
                            {"frames", change.inNew->length}};
         if (change.shots > 1)
             json["shots"] = change.shots;

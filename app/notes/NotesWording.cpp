@@ -5,6 +5,7 @@
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
 #include "app/edl/GenerationReport.h"
+#include "app/edl/ScreenTimecode.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/MatchedName.h"
 #include "core/time/Timecode.h"
@@ -98,12 +99,17 @@ std::string concatenated(std::initializer_list<std::string_view> texts)
     return all;
 }
 
-std::string NotesWording::timecode(std::int32_t frames) const
+std::string NotesWording::plainTimecode(std::int32_t frames) const
 {
     const core::Framerate& framerate = m_document.notes.framerate();
     Timecode timecode;
     timecode.setFrameCount(frames % (framerate.lastFrame + 1), framerate);
     return timecode.toString();
+}
+
+std::string NotesWording::timecode(std::int32_t frames) const
+{
+    return onScreen(plainTimecode(frames), m_document.notes.framerate());
 }
 
 std::string NotesWording::change(std::int32_t frames) const
@@ -136,7 +142,9 @@ std::string NotesWording::action(const NoteEntry& entry) const
     const NoteStep& step = *entry.step();
     switch (step.action) {
     case StepAction::Move: {
-        const bool goesFurtherOn = step.from.reel == step.place.reel && step.from.frame < step.place.frame;
+        // Between reels the row stands in the one that loses or wins the picture.
+        const bool goesFurtherOn =
+            step.from.reel == step.place.reel ? step.from.frame < step.place.frame : entry.lengthChange < 0;
         const WorkPlace& other = goesFurtherOn ? step.place : step.from;
         return "move " + timecode(step.moved) + (goesFurtherOn ? " to " : " from ") +
                timecode(m_document.notes.timecodeOf(other));
@@ -223,7 +231,8 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     case ChangeKind::Inserted: {
         std::string more;
         if (shot != nullptr)
-            more = "roll " + toPrintable(shot->rollName(), 40).text + ", source " + shot->srcIn().toString();
+            more = "roll " + toPrintable(shot->rollName(), 40).text + ", source " +
+                   onScreen(shot->srcIn().toString(), m_document.notes.framerate());
         return {"inserted " + length, name, more};
     }
     case ChangeKind::Replaced:

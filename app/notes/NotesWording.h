@@ -32,8 +32,11 @@ class NotesWording {
 public:
     explicit NotesWording(const NotesDocument& document) : m_document(document) {}
 
-    /// Of a frame count. It begins anew after 24 hours, which a reel may reach on its way to a shorter one.
+    /// Of a frame count. It begins anew after 24 hours, which a reel may reach on its way to a shorter one. Drop-frame shows
+    /// in a ";".
     std::string timecode(std::int32_t frames) const;
+    /// The same for other programs, always with ":".
+    std::string plainTimecode(std::int32_t frames) const;
     /// A length with its sign.
     std::string change(std::int32_t frames) const;
     /// 35 mm feet and frames, 16 frames a foot: "12+05". The first frame of a reel is 0+00.

@@ -8,6 +8,7 @@
 #include <cstdio>
 #include <random>
 #include <string>
+#include <vector>
 
 namespace cadrel::examples {
 
@@ -116,6 +117,15 @@ private:
     int m_clips = 0;
 };
 
+void moveTo(CutText& target, std::size_t place, CutText& source, std::size_t first, std::size_t count)
+{
+    std::vector<Shot> shots;
+    for (std::size_t shot = first; shot < first + count; ++shot)
+        shots.push_back(source.shots().at(shot));
+    source.lift(first, count);
+    target.insert(place, shots);
+}
+
 } // namespace
 
 void makeFilm(const std::filesystem::path& folder)
@@ -131,11 +141,9 @@ void makeFilm(const std::filesystem::path& folder)
         reels[static_cast<std::size_t>(reel - 1)].write(fileOf(reel, 3));
     for (int reel = 1; reel <= Reels; ++reel)
         maker.recut(reels[static_cast<std::size_t>(reel - 1)], Changes[static_cast<std::size_t>(reel - 1)]);
-    // A scene goes from the head of reel 9 to the tail of reel 8.
-    auto& from = reels[8].shots();
-    auto& to = reels[7].shots();
-    to.insert(to.end(), from.begin(), from.begin() + 5);
-    reels[8].lift(0, 5);
+    // Five shots go from the head of reel 9 to the tail of reel 8, and three from the tail of reel 12 to the head of reel 13.
+    moveTo(reels[7], reels[7].shots().size(), reels[8], 0, 5);
+    moveTo(reels[12], 0, reels[11], reels[11].shots().size() - 3, 3);
     for (int reel = 1; reel <= Reels; ++reel)
         reels[static_cast<std::size_t>(reel - 1)].write(fileOf(reel, 4));
 }

@@ -55,6 +55,33 @@ TEST(List, ShowsATableWithTheFlawsUnderTheirEventsAndTheTotals)
               "Frame rate  24 fps\n");
 }
 
+TEST(List, ATransitionThatIsLongerThanItsEventIsShown)
+{
+    // Of one second each: as long as its event, a frame longer, and far longer.
+    const TempFolder folder;
+    const std::string file =
+        folder.write("film.edl", "001  A001  V  D  024  10:00:00:00 10:00:01:00 01:00:00:00 01:00:01:00\n"
+                                 "002  A002  V  D  025  10:00:00:00 10:00:01:00 01:00:01:00 01:00:02:00\n"
+                                 "003  A003  V  W001 9999999  10:00:00:00 10:00:01:00 01:00:02:00 01:00:03:00\n");
+
+    const Outcome outcome = runCadrel({"list", file, "--rate", "24"});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(
+        outcome.out,
+        "state   event  roll  clip  file      trans      src in       src out      dst in       dst out      speed\n"
+        "ok      001    A001        film.edl  D 024      10:00:00:00  10:00:01:00  01:00:00:00  01:00:01:00   1.00\n"
+        "length  002    A002        film.edl  D 025      10:00:00:00  10:00:01:00  01:00:01:00  01:00:02:00   1.00\n"
+        "          The dissolve lasts 25 frames, and the event only 24.\n"
+        "length  003    A003        film.edl  W 9999999  10:00:00:00  10:00:01:00  01:00:02:00  01:00:03:00   1.00\n"
+        "          The wipe lasts 9999999 frames, and the event only 24.\n"
+        "\n"
+        "Events      3, all valid, 2 with a transition longer than the event\n"
+        "            0 cuts, 2 dissolves, 1 wipe, 0 retimed\n"
+        "Programme   01:00:00:00 - 01:00:03:00, 00:00:03:00 long\n"
+        "Frame rate  24 fps\n");
+}
+
 TEST(List, SummaryPrintsOnlyTheTotals)
 {
     const TempFolder folder;

@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 #include <map>
 #include <nlohmann/json.hpp>
+#include <regex>
 #include <sstream>
 
 namespace {
@@ -398,6 +399,21 @@ TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
     EXPECT_NE(outcome.out.find("move 00:00:05:00 from 00:00:10:00"), std::string::npos) << outcome.out;
 }
 
+TEST(Notes, PictureThatGoesToALaterReelIsToldWhereItGoes)
+{
+    const std::string one = cut("001", "A001", "10:00:00:12 10:00:20:12", "01:00:00:00 01:00:20:00");
+    const Cuts film(one + cut("002", "A002", "10:00:00:00 10:00:10:00", "01:00:20:00 01:00:30:00") +
+                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:00:00 02:00:30:00"),
+                    one + cut("002", "A002", "10:00:00:00 10:00:10:00", "02:00:00:00 02:00:10:00") +
+                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:10:00 02:00:40:00"));
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_NE(outcome.out.find("   1  01:00:20:00  move 00:00:10:00 to 02:00:00:00     -00:00:10:00 -00:00:10:00\n"),
+              std::string::npos)
+        << outcome.out;
+}
+
 TEST(Notes, ACutHasNothingToTellOfItself)
 {
     const Cuts film(oldCut(), oldCut());
@@ -417,6 +433,46 @@ TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_NE(outcome.out.find("   1  01:00:00:00  replace 00:00:30:00 by 00:00:10:00"), std::string::npos)
         << outcome.out;
+}
+
+TEST(Notes, DropFrameShowsInASemicolonForPeopleAlone)
+{
+    const Cuts film(oldCut(), newCut());
+    const std::regex withColons(R"(\d\d:\d\d:\d\d:\d\d)");
+    const std::regex withSemicolon(R"(\d\d:\d\d:\d\d;\d\d)");
+    const std::vector<std::string> dropFrame{"--rate", "29.97 dfps"};
+
+    const std::string text = film.notes(dropFrame).out;
+
+    EXPECT_NE(text.find("01:00:10;00"), std::string::npos) << text;
+    EXPECT_FALSE(std::regex_search(text, withColons)) << text;
+    EXPECT_TRUE(std::regex_search(film.file(".html", dropFrame), withSemicolon));
+    // The columns of the table are for programs, the words in it for people.
+    EXPECT_TRUE(std::regex_search(film.file(".csv", dropFrame), withColons));
+    EXPECT_TRUE(std::regex_search(film.file(".json", dropFrame), withColons));
+    EXPECT_FALSE(std::regex_search(film.file(".json", dropFrame), withSemicolon));
+    EXPECT_FALSE(std::regex_search(film.notes({"--rate", "30 fps"}).out, withSemicolon));
+}
+
+TEST(Notes, AFileThatComesUpDuringTheRunIsNotOverwritten)
+{
+    const std::string shots = manyShots(20000);
+    const TempFolder folder;
+    const std::string notes = folder / "notes.txt";
+    const std::vector<std::string> words{
+        "notes", "--old", folder.write("old.edl", shots), "--new", folder.write("new.edl", shots), "-o", notes};
+    const auto disturb = [&] { writeFile(notes, "of another program"); };
+
+    const Outcome outcome = runCadrelDisturbedAt("reading new.edl", words, disturb);
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_NE(outcome.out.find(notes + ": another program has written it meanwhile"), std::string::npos) << outcome.out;
+    EXPECT_EQ(contentOf(notes), "of another program");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "notes.txt", "old.edl"}));
+    std::vector<std::string> replacing = words;
+    replacing.emplace_back("--overwrite");
+    EXPECT_EQ(runCadrelDisturbedAt("reading new.edl", replacing, disturb).status, 0);
+    EXPECT_NE(contentOf(notes), "of another program");
 }
 
 TEST(Notes, RefusesAFormThatItDoesNotKnow)
