@@ -141,9 +141,15 @@ void TcInput::setValue(const core::Timecode& timecode, juce::NotificationType no
 
 void TcInput::setActive(bool isActive)
 {
-    m_disableOverlay.setVisible(!isActive);
-    m_disableOverlay.toFront(false);
     setEnabled(isActive);
+}
+
+void TcInput::enablementChanged()
+{
+    guardSystem([this] {
+        m_disableOverlay.setVisible(!isEnabled());
+        m_disableOverlay.toFront(false);
+    });
 }
 
 void TcInput::setBackgroundColour(juce::Colour colour)

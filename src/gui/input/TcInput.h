@@ -46,6 +46,8 @@ public:
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;
+    /// The input is covered also when what it lies on is disabled.
+    void enablementChanged() override;
     /// Steps the field under the mouse, or flips the sign, when the input has the focus.
     void mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel) override;
     bool keyPressed(const juce::KeyPress& key) override;

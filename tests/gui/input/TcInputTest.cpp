@@ -445,6 +445,17 @@ TEST_F(TcInputTest, IgnoresTheWheelAndIsCoveredWhileItIsNotActive)
     EXPECT_TRUE(input->isEnabled());
 }
 
+TEST_F(TcInputTest, IsCoveredAlsoWhenWhatItLiesOnIsDisabled)
+{
+    open(false);
+    const juce::Component& overlay = *input->getChildComponent(input->getNumChildComponents() - 1);
+
+    input->getParentComponent()->setEnabled(false);
+    EXPECT_TRUE(overlay.isVisible());
+    input->getParentComponent()->setEnabled(true);
+    EXPECT_FALSE(overlay.isVisible());
+}
+
 TEST_F(TcInputTest, TellsTheLastListenerFirstAndEachOnce)
 {
     open(false);
