@@ -8,7 +8,7 @@
 #include <juce_gui_basics/juce_gui_basics.h>
 
 #include <array>
-#include <cstddef>
+#include <memory>
 #include <optional>
 
 namespace cadrel::gui {
@@ -63,8 +63,9 @@ private:
 
     TimecodeEntry::Texts texts() const;
     void showValue();
-    /// Takes what the editors hold. Nothing of the input may be touched afterwards, if listeners are told.
-    void commit(juce::NotificationType notification);
+    /// Takes what the editors hold, and shows the value. Whether it is another one.
+    bool take();
+    /// Nothing of the input may be touched afterwards.
     void tell();
 
     TimecodeEntry m_entry;

@@ -221,6 +221,7 @@ TEST_F(TcInputTest, BringsBackTheFormerFramesForFramesOverTheRate)
     window.type("99");
 
     EXPECT_EQ(shown(), "+01:02:03:04");
+    EXPECT_EQ(frames().getHighlightedText(), "04");
     EXPECT_TRUE(listener.heard.empty());
     EXPECT_TRUE(alerts.messages.empty());
 }
