@@ -30,6 +30,7 @@ struct SoundChange {
     SoundChangeKind kind{};
     std::size_t track = 0; ///< place in the list of tracks
     std::string name;
+    std::string part; ///< that it lies in; empty for none
     bool isMarker = false;
     SecondsRange was;                ///< all of the clip in the old programme; of no meaning for an added one
     SecondsRange lost;               ///< what of it is gone; without a length where it is only cut apart

@@ -127,11 +127,11 @@ TEST(SoundNotes, TellsEachChangeAtTheStepThatCausesIt)
     // B loses its tail and X comes in; then D moves to before C.
     ASSERT_EQ(recut.notes.totals().steps, 2U);
     SoundFacts facts;
-    facts.changes = {{SoundChangeKind::Split, 1, "wind", false, at(12, 28), at(17, 20), {}},
-                     {SoundChangeKind::TailTrimmed, 0, "line", false, at(11, 18), at(17, 18), {}},
-                     {SoundChangeKind::Split, 1, "river", false, at(25, 35), at(32, 32), {}},
-                     {SoundChangeKind::Doubled, 0, "far away", false, at(1, 2), {}, at(3, 4)},
-                     {SoundChangeKind::FellOut, 0, "step", false, at(18, 19), at(18, 19), {}}};
+    facts.changes = {{SoundChangeKind::Split, 1, "wind", {}, false, at(12, 28), at(17, 20), {}},
+                     {SoundChangeKind::TailTrimmed, 0, "line", {}, false, at(11, 18), at(17, 18), {}},
+                     {SoundChangeKind::Split, 1, "river", {}, false, at(25, 35), at(32, 32), {}},
+                     {SoundChangeKind::Doubled, 0, "far away", {}, false, at(1, 2), {}, at(3, 4)},
+                     {SoundChangeKind::FellOut, 0, "step", {}, false, at(18, 19), at(18, 19), {}}};
     facts.jumps = {{at(17, 17), "FX"}, {at(32, 32), "DIA"}};
 
     const SoundNotes sound(recut.notes, facts);
@@ -238,7 +238,7 @@ RC_GTEST_PROP(SoundNotesLaw, EachChangeOfTheSoundIsToldOnce, ())
     for (const auto& [start, length] : places) {
         const SecondsRange range{start / 10.0, (start + length) / 10.0};
         facts.changes.push_back({length % 2 == 0 ? SoundChangeKind::Split : SoundChangeKind::Doubled, 0,
-                                 std::to_string(facts.changes.size()), false, range, range, std::nullopt});
+                                 std::to_string(facts.changes.size()), {}, false, range, range, std::nullopt});
         if (length % 2 != 0)
             facts.changes.back().now = range;
     }
