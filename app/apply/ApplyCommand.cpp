@@ -404,7 +404,7 @@ public:
             checkCuts(plausibility, runs, terminal);
         require(plausibility.doubtOfChanges(runs, !source.cuts, allowedFrames(model.settings())), options, terminal);
         remember(runs, model);
-        plan(source.cuts.has_value());
+        plan(source.cuts.has_value(), terminal);
         if (source.cuts) {
             require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options, terminal);
             m_facts.generation.emplace(model, isPlanned(source) ? m_kept->carried() : model.changeEdl(), *source.cuts,
@@ -431,7 +431,7 @@ private:
             requireChangeEvents(m_hosted.model(), m_options.generation);
     }
 
-    void plan(bool isGenerated)
+    void plan(bool isGenerated, Terminal& terminal)
     {
         DataModel& model = m_hosted.model();
         const bool isPlanned = m_options.keep == ApplyOptions::Keep::All;
@@ -441,7 +441,8 @@ private:
         if (!isPlanned)
             return;
         m_kept.emplace(model, m_hosted.project(), m_clock,
-                       isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_options.isForced, m_edls);
+                       isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_edls,
+                       [&](const Failure& doubt) { require(doubt, m_options, terminal); });
         m_facts.isRunNeeded = m_kept->needsRun();
         m_facts.isHeldBack = m_kept->plan().isHeldBack;
         const Framerate framerate = Timecode::framerate();
@@ -511,13 +512,13 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
     facts.reportBackups = formerReport.names();
     std::optional<Output> report;
     if (Output::isFile(options.jsonFile)) {
-        report.emplace(options.jsonFile);
+        report.emplace(options.jsonFile, options.replacing.isAllowed);
         writeReport(*report, hosted.model(), ApplyJson(facts, clock));
         report->finish();
     }
     std::optional<Output> page;
     if (!options.notesFile.empty()) {
-        page.emplace(options.notesFile);
+        page.emplace(options.notesFile, options.replacing.isAllowed);
         notesWriterFor("--notes", options.notesFile)(notes->document(),
                                                      [&page](std::string_view text) { page->write(text); });
         page->finish();
@@ -566,7 +567,7 @@ void printHint(const ApplyNotes* notes, const ApplyOptions& options)
 void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyNotes* notes, const ApplyOptions& options)
 {
     if (Output::isStandardOutput(options.jsonFile)) {
-        Output output(options.jsonFile);
+        Output output(options.jsonFile, true);
         writeReport(output, facts.model, ApplyJson(facts, clock));
         output.place();
         return;

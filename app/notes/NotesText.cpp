@@ -40,18 +40,20 @@ std::string trimmedEnd(std::string line)
 /// Broken at blanks where it is too long; the further lines are indented.
 std::string wrapped(const std::string& text, const std::string& indent)
 {
+    const auto widthOf = [](const std::string& part) { return toPrintable(part).width; };
     std::string lines;
     std::string line;
-    const auto widthOf = [](const std::string& part) { return toPrintable(part).width; };
+    bool hasWord = false;
     for (std::size_t start = 0; start <= text.size();) {
         const std::size_t end = std::min(text.find(' ', start), text.size());
         const std::string word = text.substr(start, end - start);
-        if (!line.empty() && widthOf(line) + 1 + widthOf(word) > Width) {
+        if (hasWord && widthOf(line) + 1 + widthOf(word) > Width) {
             lines += line + "\n";
             line = indent + word;
         } else {
-            line += (start == 0 ? "" : " ") + word;
+            line.append(start == 0 ? "" : " ").append(word);
         }
+        hasWord = hasWord || !word.empty();
         start = end + 1;
     }
     return lines + line + "\n";
@@ -67,6 +69,7 @@ public:
         sink(figures());
         sink(soundTotals());
         sink(largest());
+        sink(reels());
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
             sink(concatenated({"\n", m_words.reelTitle(reel), "\n", m_words.reelLengths(reel), "\n\n"}));
             sink(trimmedEnd(padded("step", Indent.size()) + padded("at", 13) + padded("what to do", ActionWidth + 1) +
@@ -125,12 +128,26 @@ private:
             return "\nNothing has changed.\n";
         std::string text = "\nThe largest changes\n";
         for (const NoteEntry* const entry : steps) {
-            const ChangeWords words = m_words.describe(NotesWording::largestChange(*entry));
             text += trimmedEnd(padded(numberText(entry->number), Indent.size()) +
-                               padded(m_words.action(*entry), ActionWidth) + toPrintable(words.shot, 39).text);
+                               padded(m_words.action(*entry), ActionWidth) + m_words.shotsOf(*entry));
             if (const core::StepSound* const sound = m_words.soundOf(*entry); sound != nullptr && !sound->isEmpty())
                 text += wrapped(Indent + "sound: " + SoundWording::shortSummary(*sound), Indent + "  ");
         }
+        return text;
+    }
+
+    /// A line a reel where there are several.
+    std::string reels() const
+    {
+        const auto& all = m_document.notes.reels();
+        if (all.size() < 2)
+            return {};
+        std::string text = "\nThe reels\n  reel  begins       before       after        change        steps\n";
+        for (std::size_t reel = 0; reel < all.size(); ++reel)
+            text += numberText(reel + 1) + "    " + m_words.reelStart(reel) + "  " +
+                    m_words.timecode(all[reel].before) + "  " + m_words.timecode(all[reel].after) + " " +
+                    m_words.change(all[reel].after - all[reel].before) + "  " + numberText(m_words.stepsOf(reel)) +
+                    "\n";
         return text;
     }
 

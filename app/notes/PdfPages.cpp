@@ -4,6 +4,7 @@
 
 #include "app/console/Failure.h"
 
+#include <algorithm>
 #include <cairo-pdf.h>
 
 namespace cadrel::app {
@@ -86,6 +87,11 @@ PdfPages::Texts& PdfPages::textsFor(cairo_scaled_font_t* font, const PdfColour& 
     return m_texts.emplace_back(Texts{font, colour, {}, {}, {}});
 }
 
+double PdfPages::widthOf(const std::string& utf8, const PdfFont& font)
+{
+    return widthOf(utf8, fontFor(font));
+}
+
 void PdfPages::text(double x, double y, const std::string& utf8, const PdfFont& font, const PdfColour& colour)
 {
     cairo_scaled_font_t* const scaled = fontFor(font).scaled.get();
@@ -142,6 +148,22 @@ std::string PdfPages::fitting(const std::string& utf8, const PdfFont& font, doub
             cut.pop_back();
     }
     return cut + "…";
+}
+
+std::vector<std::string> PdfPages::wrapped(const std::string& utf8, const PdfFont& font, double width)
+{
+    Font& measuring = fontFor(font);
+    std::vector<std::string> lines;
+    for (std::size_t start = 0; start <= utf8.size();) {
+        const std::size_t end = std::min(utf8.find(' ', start), utf8.size());
+        const std::string word = utf8.substr(start, end - start);
+        if (lines.empty() || widthOf(lines.back() + " " + word, measuring) > width)
+            lines.push_back(fitting(word, font, width));
+        else
+            lines.back().append(" ").append(word);
+        start = end + 1;
+    }
+    return lines;
 }
 
 void PdfPages::box(double x, double y, double width, double height, const PdfColour& colour)

@@ -184,7 +184,7 @@ TEST(ApplyNotes, TheJsonHasTheTimesOfEachChange)
 
 TEST(ApplyNotes, TheJsonKeepsToItsSchema)
 {
-    const JsonSchema schema(json::parse(contentOf(treePath("docs/notes.schema.json"))));
+    const JsonSchema schema("notes");
     const Sound sound("DIA", "long line", {track("marker", "Scenes", range("1", 3600, 3630))});
     const json notes = sound.notesAsJson();
 

@@ -1,31 +1,19 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/Application.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/edit/ProjectManager.h"
-#include "standin/module/ModuleLoader.h"
 #include "standin/project/Project.h"
 #include "standin/services/WindowFactoryRegistry.h"
-#include "standin/window/HostWindow.h"
-#include "standin/window/ViewManager.h"
-#include "velmark/FieldText.h"
 #include "velmark/UserInterface.h"
 
-#include "tests/support/TreePaths.h"
-#include "tests/support/x11/VirtualScreen.h"
-#include "tests/support/x11/XWindows.h"
+#include "tests/module/LoadedModule.h"
+#include "tests/support/ThisProcess.h"
 
 #include <gtest/gtest.h>
 
-#include <chrono>
 #include <cstdio>
-#include <filesystem>
-#include <fstream>
-#include <functional>
 #include <set>
 #include <string>
-#include <thread>
-#include <vector>
 
 #include <X11/Xlib.h>
 
@@ -33,83 +21,13 @@
 #include <unistd.h>
 
 using namespace Velmark;
-using cadrel::tests::VirtualScreen;
-using cadrel::tests::XWindows;
-using standin::Application;
-using standin::ModuleLoader;
-
-namespace fs = std::filesystem;
+using cadrel::tests::isModuleMapped;
+using cadrel::tests::modulePath;
+using cadrel::tests::ProcessResources;
 
 namespace {
 
-constexpr unsigned long Background = 0x2b2c2d;
-
-fs::path modulePath()
-{
-    return fs::path(cadrel::tests::programPath("../lib/Cadrel.so")).lexically_normal();
-}
-
-fs::path resources()
-{
-    return cadrel::tests::treePath("resources");
-}
-
-bool isMapped()
-{
-    std::ifstream maps("/proc/self/maps");
-    for (std::string line; std::getline(maps, line);) {
-        if (line.ends_with("/Cadrel.so"))
-            return true;
-    }
-    return false;
-}
-
-std::size_t countOf(const fs::path& folder)
-{
-    return static_cast<std::size_t>(std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
-}
-
-/// A host with a screen, which may load the module.
-class LoadedModuleTest : public testing::Test {
-protected:
-    LoadedModuleTest() { m_application.views().setWindowSystem(&m_windows); }
-    ~LoadedModuleTest() override { m_application.views().setWindowSystem(nullptr); }
-
-    void load() { m_module = std::make_unique<ModuleLoader>(m_application, modulePath(), resources()); }
-    void unload() { m_module.reset(); }
-
-    /// Lets host and module work for one turn of the host's loop.
-    void turn()
-    {
-        m_windows.serve();
-        m_application.idle();
-        std::this_thread::sleep_for(std::chrono::milliseconds(15));
-    }
-    /// Until the condition holds; false when it doesn't within ten seconds.
-    bool turnUntil(const std::function<bool()>& condition)
-    {
-        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-        while (!condition()) {
-            if (std::chrono::steady_clock::now() > end)
-                return false;
-            turn();
-        }
-        return true;
-    }
-
-    bool openWindow() { return m_application.choose(m_application.menus().commands().front()) && window(); }
-    standin::HostWindow* window()
-    {
-        const auto& open = m_application.views().windows();
-        return open.empty() ? nullptr : open.front().get();
-    }
-    bool isDrawn() { return m_windows.colourAt(400, 400) == Background; }
-
-    VirtualScreen m_screen;
-    XWindows m_windows;
-    Application m_application;
-    std::unique_ptr<ModuleLoader> m_module;
-};
+using LoadedModuleTest = cadrel::tests::LoadedModule;
 
 } // namespace
 
@@ -239,19 +157,17 @@ TEST_F(LoadedModuleTest, IsUnmappedAfterEachOfTwentyRounds)
     ASSERT_TRUE(openWindow());
     ASSERT_TRUE(turnUntil([this] { return isDrawn(); }));
     unload();
-    ASSERT_FALSE(isMapped());
-    const std::size_t threads = countOf("/proc/self/task");
-    const std::size_t descriptors = countOf("/proc/self/fd");
+    ASSERT_FALSE(isModuleMapped());
+    const ProcessResources before;
 
     for (int round = 0; round < 20; ++round) {
         load();
-        ASSERT_TRUE(isMapped()) << round;
+        ASSERT_TRUE(isModuleMapped()) << round;
         ASSERT_TRUE(openWindow()) << round;
         ASSERT_TRUE(turnUntil([this] { return isDrawn(); })) << round;
         unload();
-        ASSERT_FALSE(isMapped()) << round;
-        EXPECT_EQ(countOf("/proc/self/task"), threads) << round;
-        EXPECT_EQ(countOf("/proc/self/fd"), descriptors) << round;
+        ASSERT_FALSE(isModuleMapped()) << round;
+        EXPECT_EQ(ProcessResources(), before) << round;
     }
 }
 
@@ -282,8 +198,7 @@ TEST_F(LoadedModuleTest, SurvivesAWindowOfTheHostThatGoesFirst)
     ASSERT_TRUE(turnUntil([this] { return isDrawn(); }));
 
     m_windows.destroy(*window()->native());
-    for (int count = 0; count < 10; ++count)
-        turn();
+    turn(10);
     window()->show(false);
 
     ASSERT_TRUE(openWindow());
@@ -297,7 +212,7 @@ TEST_F(LoadedModuleTest, StaysInMemoryWhereSomebodyMayStillCallItsErrorHandler)
         load();
         XSetErrorHandler([](Display*, XErrorEvent*) { return 0; });
         unload();
-        return isMapped();
+        return isModuleMapped();
     };
     EXPECT_EXIT(_exit(isStillMapped() ? 0 : 1), testing::ExitedWithCode(0), "");
 }
@@ -316,7 +231,7 @@ TEST_F(LoadedModuleTest, LetsGoOfAViewThatTheHostKeeps)
     view.reset();
     unload();
 
-    EXPECT_FALSE(isMapped());
+    EXPECT_FALSE(isModuleMapped());
 }
 
 TEST_F(LoadedModuleTest, MakesItsViewForItsOwnWindowAndOnlyOnce)
@@ -382,7 +297,7 @@ TEST_F(LoadedModuleTest, SurvivesItsUnloadingWithTheWindowOpenAndUndoAfterwards)
     unload();
 
     EXPECT_EQ(window(), nullptr);
-    EXPECT_FALSE(isMapped());
+    EXPECT_FALSE(isModuleMapped());
     m_application.actions().invoke(IActionManager::EditCategory, IActionManager::Undo, 0);
     turn();
 }

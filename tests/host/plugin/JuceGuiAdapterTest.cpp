@@ -7,6 +7,7 @@
 #include "standin/window/HostWindow.h"
 #include "velmark/Context.h"
 
+#include "tests/support/x11/HostLoop.h"
 #include "tests/support/x11/VirtualScreen.h"
 #include "tests/support/x11/XUser.h"
 #include "tests/support/x11/XWindows.h"
@@ -16,13 +17,10 @@
 #include <X11/keysym.h>
 
 #include <algorithm>
-#include <chrono>
-#include <functional>
 #include <memory>
 #include <optional>
 #include <stdexcept>
 #include <string>
-#include <thread>
 #include <vector>
 
 using namespace Velmark;
@@ -109,7 +107,7 @@ public:
     std::vector<std::string> invoked;
 };
 
-class JuceGuiAdapterTest : public testing::Test {
+class JuceGuiAdapterTest : public testing::Test, protected cadrel::tests::HostLoop {
 protected:
     ~JuceGuiAdapterTest() override
     {
@@ -160,21 +158,10 @@ protected:
         open();
     }
 
-    void turn()
+    void work() override
     {
         m_windows->serve();
         m_view->idle();
-        std::this_thread::sleep_for(std::chrono::milliseconds(10));
-    }
-    bool turnUntil(const std::function<bool()>& condition)
-    {
-        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-        while (!condition()) {
-            if (std::chrono::steady_clock::now() > end)
-                return false;
-            turn();
-        }
-        return true;
     }
     bool has(const std::string& call) const { return std::find(m_calls.begin(), m_calls.end(), call) != m_calls.end(); }
     /// In the empty part of the content.
@@ -306,8 +293,7 @@ TEST_F(JuceGuiAdapterTest, SendsAKeyOnAsTheUserHasPressedIt)
     m_user->press(XK_KP_Enter);
     m_user->press('b', XK_Control_L);
     EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() >= 12; }));
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_EQ(m_windows->keyEvents(),
               (std::vector<std::string>{"press KP_Add", "release KP_Add", "press plus", "release plus",
                                         "press KP_Subtract", "release KP_Subtract", "press KP_Home", "release KP_Home",
@@ -321,8 +307,7 @@ TEST_F(JuceGuiAdapterTest, SendsTheReleaseOfAKeyOnWhenItComes)
 
     m_user->hold(XK_F5);
     EXPECT_TRUE(turnUntil([this] { return !m_windows->keyEvents().empty(); }));
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_EQ(m_windows->keyEvents(), std::vector<std::string>{"press F5"});
     m_user->release(XK_F5);
     EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() > 1; }));
@@ -340,8 +325,7 @@ TEST_F(JuceGuiAdapterTest, KeepsTabWhichMovesTheKeyboardFromFieldToField)
     EXPECT_TRUE(turnUntil([this] { return m_content->second.hasKeyboardFocus(true); }));
     m_user->press(XK_Tab, XK_Shift_L);
     EXPECT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_EQ(m_windows->keyEvents(), std::vector<std::string>());
 }
 
@@ -388,8 +372,7 @@ TEST_F(JuceGuiAdapterTest, AnswersWhetherItHasUsedAKeyOfTheHost)
     EXPECT_TRUE(has("key shift + alt + F12"));
     EXPECT_EQ(m_view->onKeyDown(0, 0, 0), 0);
     EXPECT_EQ(m_view->onKeyUp(u'a', 0, 0), 0);
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_TRUE(m_windows->keys().empty());
 }
 
