@@ -6,6 +6,8 @@
 #include "standin/module/ModuleLoader.h"
 #include "standin/window/HostWindow.h"
 #include "standin/window/ViewManager.h"
+#include "velmark/Module.h"
+#include "velmark/PluginFactory.h"
 
 #include "tests/support/ThisProcess.h"
 #include "tests/support/TreePaths.h"
@@ -18,7 +20,10 @@
 #include <filesystem>
 #include <memory>
 #include <sstream>
+#include <stdexcept>
 #include <string>
+
+#include <dlfcn.h>
 
 namespace cadrel::tests {
 
@@ -31,6 +36,37 @@ inline bool isModuleMapped()
 {
     return isMapped("Cadrel.so");
 }
+
+/// The module's three functions, for a host that calls them in another way than the stand-in's does.
+struct ModuleFunctions {
+    ModuleFunctions() : object(dlopen(modulePath().c_str(), RTLD_NOW | RTLD_LOCAL))
+    {
+        if (!object)
+            throw std::runtime_error(dlerror());
+        enter = reinterpret_cast<bool (*)(void*)>(dlsym(object, "bundleEntry"));
+        leave = reinterpret_cast<bool (*)()>(dlsym(object, "bundleExit"));
+        getFactory = reinterpret_cast<Velmark::IPluginFactory* (*)()>(dlsym(object, "GetPluginFactory"));
+    }
+    ModuleFunctions(const ModuleFunctions&) = delete;
+    ModuleFunctions& operator=(const ModuleFunctions&) = delete;
+    ~ModuleFunctions() { dlclose(object); }
+
+    /// Not yet initialised.
+    Velmark::Counted<Velmark::IPluginBase> makeController() const
+    {
+        const auto factory = Velmark::Counted<Velmark::IPluginFactory>::adopt(getFactory());
+        Velmark::PClassInfo info;
+        factory->getClassInfo(0, info);
+        Velmark::Counted<Velmark::IPluginBase> controller;
+        factory->createInstance(info.cid, Velmark::IPluginBase::iid, reinterpret_cast<void**>(controller.out()));
+        return controller;
+    }
+
+    void* object;
+    bool (*enter)(void*) = nullptr;
+    bool (*leave)() = nullptr;
+    Velmark::IPluginFactory* (*getFactory)() = nullptr;
+};
 
 /// A host with a screen, in plain Xlib, which may load the module.
 class LoadedModule : public testing::Test, protected HostLoop {

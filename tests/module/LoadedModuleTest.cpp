@@ -3,11 +3,14 @@
 #include "standin/edit/ActionManager.h"
 #include "standin/edit/ProjectManager.h"
 #include "standin/project/Project.h"
+#include "standin/services/IdleManager.h"
 #include "standin/services/WindowFactoryRegistry.h"
 #include "velmark/UserInterface.h"
 
 #include "tests/module/LoadedModule.h"
 #include "tests/support/ThisProcess.h"
+#include "tests/support/TreePaths.h"
+#include "tests/support/host/AlteredContext.h"
 
 #include <gtest/gtest.h>
 
@@ -17,17 +20,24 @@
 
 #include <X11/Xlib.h>
 
-#include <dlfcn.h>
 #include <unistd.h>
 
 using namespace Velmark;
 using cadrel::tests::isModuleMapped;
+using cadrel::tests::ModuleFunctions;
 using cadrel::tests::modulePath;
 using cadrel::tests::ProcessResources;
 
 namespace {
 
 using LoadedModuleTest = cadrel::tests::LoadedModule;
+
+class OtherHost : public Implements<OtherHost, FObject, IHostInfo> {
+public:
+    static constexpr const char* ClassName = "OtherHost";
+
+    const char* getName() override { return "Studio"; }
+};
 
 } // namespace
 
@@ -76,22 +86,73 @@ TEST_F(LoadedModuleTest, NamesItsMakerAndItsOneClass)
 
 TEST_F(LoadedModuleTest, GivesTheSameFactoryUntilItsLastRelease)
 {
-    void* const object = dlopen(modulePath().c_str(), RTLD_NOW | RTLD_LOCAL);
-    ASSERT_NE(object, nullptr);
-    auto* const getFactory = reinterpret_cast<IPluginFactory* (*)()>(dlsym(object, "GetPluginFactory"));
+    const ModuleFunctions module;
 
-    IPluginFactory* const first = getFactory();
-    IPluginFactory* const second = getFactory();
+    IPluginFactory* const first = module.getFactory();
+    IPluginFactory* const second = module.getFactory();
     EXPECT_EQ(first, second);
     EXPECT_EQ(first->countClasses(), 1);
     EXPECT_EQ(first->release(), 1);
     EXPECT_EQ(first->release(), 0);
 
-    IPluginFactory* const third = getFactory();
+    IPluginFactory* const third = module.getFactory();
     ASSERT_NE(third, nullptr);
     EXPECT_EQ(third->countClasses(), 1);
     EXPECT_EQ(third->release(), 0);
-    dlclose(object);
+}
+
+TEST_F(LoadedModuleTest, TakesItsResourcesFromTheFirstEntrySinceItWasOutOfUse)
+{
+    const ModuleFunctions module;
+    std::string resources = cadrel::tests::treePath("resources");
+    std::string elsewhere = "/nowhere";
+    EXPECT_TRUE(module.enter(nullptr));
+    EXPECT_TRUE(module.enter(resources.data()));
+    EXPECT_TRUE(module.enter(elsewhere.data()));
+    EXPECT_TRUE(module.leave());
+    auto controller = module.makeController();
+    const auto canOpen = [&] {
+        EXPECT_EQ(controller->initialize(m_application.context()), ResultOk);
+        const bool isOpen = openWindow();
+        controller->terminate();
+        return isOpen;
+    };
+    EXPECT_TRUE(canOpen());
+
+    EXPECT_TRUE(module.leave());
+    EXPECT_TRUE(module.leave()) << "One too many.";
+    EXPECT_TRUE(module.enter(elsewhere.data()));
+    EXPECT_FALSE(canOpen());
+
+    EXPECT_TRUE(module.leave());
+    EXPECT_TRUE(module.enter(resources.data()));
+    EXPECT_TRUE(canOpen());
+    EXPECT_TRUE(module.leave());
+    controller.reset();
+}
+
+TEST_F(LoadedModuleTest, MakesNothingOfAnotherClass)
+{
+    load();
+    void* out = this;
+
+    EXPECT_NE(m_module->factory().createInstance(IPluginBase::iid, IPluginBase::iid, &out), ResultOk);
+    EXPECT_EQ(out, nullptr);
+    EXPECT_NE(m_module->factory().createInstance(Identifier("F61C1C254C9D4D68A782F7FBF56B9068"), IHostInfo::iid, &out),
+              ResultOk);
+    EXPECT_EQ(out, nullptr);
+}
+
+TEST_F(LoadedModuleTest, WorksInNoHostOfAnotherName)
+{
+    const auto context = makeCounted<cadrel::host::tests::AlteredContext>(m_application.context());
+    context->replace(IHostInfo::iid, makeCounted<OtherHost>());
+
+    EXPECT_THROW(load(context.get()), standin::ModuleError);
+    EXPECT_TRUE(m_application.menus().commands().empty());
+    EXPECT_TRUE(m_application.windowFactories().factories().empty());
+    EXPECT_TRUE(m_application.idleManager().handlers().empty());
+    EXPECT_FALSE(isModuleMapped());
 }
 
 TEST_F(LoadedModuleTest, EntersItsCommandAndItsWindowAndTakesThemBack)

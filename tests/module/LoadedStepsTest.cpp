@@ -24,15 +24,13 @@
 #include <string>
 #include <vector>
 
-#include <dlfcn.h>
-
 using namespace Velmark;
 using cadrel::core::CadrelerBase;
 using cadrel::core::DataModel;
 using cadrel::core::EventList;
 using cadrel::tests::isModuleMapped;
 using cadrel::tests::makeEvent;
-using cadrel::tests::modulePath;
+using cadrel::tests::ModuleFunctions;
 using cadrel::tests::StoredModel;
 using cadrel::util::Result;
 
@@ -199,17 +197,10 @@ TEST_F(LoadedStepsTest, OfAPreviewAreDroppedWithItsWindowOpen)
 TEST_F(LoadedStepsTest, RefuseOnceItsObjectHasGone)
 {
     // As a host that releases the object, and keeps the module and its undo lists.
-    void* const object = dlopen(modulePath().c_str(), RTLD_NOW | RTLD_LOCAL);
-    ASSERT_NE(object, nullptr);
+    const ModuleFunctions module;
     std::string resources = cadrel::tests::treePath("resources");
-    reinterpret_cast<bool (*)(void*)>(dlsym(object, "bundleEntry"))(resources.data());
-    auto factory =
-        Counted<IPluginFactory>::adopt(reinterpret_cast<IPluginFactory* (*)()>(dlsym(object, "GetPluginFactory"))());
-    PClassInfo info;
-    ASSERT_EQ(factory->getClassInfo(0, info), ResultOk);
-    Counted<IPluginBase> controller;
-    ASSERT_EQ(factory->createInstance(info.cid, IPluginBase::iid, reinterpret_cast<void**>(controller.out())),
-              ResultOk);
+    ASSERT_TRUE(module.enter(resources.data()));
+    Counted<IPluginBase> controller = module.makeController();
     ASSERT_EQ(controller->initialize(m_application.context()), ResultOk);
     m_project = &openFilm("Film.stage");
     const std::string before = contentOf(*m_project);
@@ -226,8 +217,5 @@ TEST_F(LoadedStepsTest, RefuseOnceItsObjectHasGone)
     EXPECT_EQ(contentOf(*m_project), after);
 
     m_project->undoList().clear();
-    factory.reset();
-    reinterpret_cast<bool (*)()>(dlsym(object, "bundleExit"))();
-    dlclose(object);
-    EXPECT_FALSE(isModuleMapped());
+    EXPECT_TRUE(module.leave());
 }

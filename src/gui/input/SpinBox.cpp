@@ -78,20 +78,24 @@ void SpinBox::setBackgroundColour(juce::Colour colour)
 
 void SpinBox::paint(juce::Graphics& graphics)
 {
-    graphics.fillAll(m_backgroundColour);
+    guardSystem([&] { graphics.fillAll(m_backgroundColour); });
 }
 
 void SpinBox::paintOverChildren(juce::Graphics& graphics)
 {
-    if (hasKeyboardFocus(false))
-        drawFocusRing(graphics, m_valueDisplay.getBounds().toFloat(), 0.0F);
+    guardSystem([&] {
+        if (hasKeyboardFocus(false))
+            drawFocusRing(graphics, m_valueDisplay.getBounds().toFloat(), 0.0F);
+    });
 }
 
 void SpinBox::resized()
 {
-    m_valueDisplay.setBounds(0, 0, getWidth() - 20, 20);
-    m_upButton.setBounds(getWidth() - 11, 1, 10, 8);
-    m_downButton.setBounds(getWidth() - 11, 11, 10, 8);
+    guardSystem([&] {
+        m_valueDisplay.setBounds(0, 0, getWidth() - 20, 20);
+        m_upButton.setBounds(getWidth() - 11, 1, 10, 8);
+        m_downButton.setBounds(getWidth() - 11, 11, 10, 8);
+    });
 }
 
 void SpinBox::mouseDown(const juce::MouseEvent& event)

@@ -54,6 +54,7 @@ private:
     void openEditor();
     void step(bool isUp);
     void showValue();
+    /// Nothing of the input may be touched afterwards.
     void tell();
 
     NumberEntry m_entry;

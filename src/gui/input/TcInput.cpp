@@ -141,9 +141,15 @@ void TcInput::setValue(const core::Timecode& timecode, juce::NotificationType no
 
 void TcInput::setActive(bool isActive)
 {
-    m_disableOverlay.setVisible(!isActive);
-    m_disableOverlay.toFront(false);
     setEnabled(isActive);
+}
+
+void TcInput::enablementChanged()
+{
+    guardSystem([this] {
+        m_disableOverlay.setVisible(!isEnabled());
+        m_disableOverlay.toFront(false);
+    });
 }
 
 void TcInput::setBackgroundColour(juce::Colour colour)
@@ -154,21 +160,23 @@ void TcInput::setBackgroundColour(juce::Colour colour)
 
 void TcInput::paint(juce::Graphics& graphics)
 {
-    graphics.fillAll(m_backgroundColour);
+    guardSystem([&] { graphics.fillAll(m_backgroundColour); });
 }
 
 void TcInput::resized()
 {
-    const int y = getHeight() / 2 - FieldHeight / 2;
-    const auto put = [y](juce::Component& component, const Place& place) {
-        component.setBounds(place.x, y, place.width, FieldHeight);
-    };
-    for (std::size_t field = 0; field < m_fields.size(); ++field)
-        put(*m_fields[field], FieldPlaces[field]);
-    put(*m_sign, SignPlace);
-    for (std::size_t colon = 0; colon < m_colons.size(); ++colon)
-        put(m_colons[colon], ColonPlaces[colon]);
-    m_disableOverlay.setBounds(getLocalBounds());
+    guardSystem([&] {
+        const int y = getHeight() / 2 - FieldHeight / 2;
+        const auto put = [y](juce::Component& component, const Place& place) {
+            component.setBounds(place.x, y, place.width, FieldHeight);
+        };
+        for (std::size_t field = 0; field < m_fields.size(); ++field)
+            put(*m_fields[field], FieldPlaces[field]);
+        put(*m_sign, SignPlace);
+        for (std::size_t colon = 0; colon < m_colons.size(); ++colon)
+            put(m_colons[colon], ColonPlaces[colon]);
+        m_disableOverlay.setBounds(getLocalBounds());
+    });
 }
 
 void TcInput::mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel)
@@ -193,10 +201,10 @@ bool TcInput::keyPressed(const juce::KeyPress& key)
         if ((!isReturn && !isEscape) || texts() == m_entry.texts())
             return;
         isUsed = true;
-        if (isReturn)
-            commit(juce::sendNotification);
-        else
+        if (isEscape)
             showValue();
+        else if (take())
+            tell();
     });
     return isUsed;
 }
@@ -204,8 +212,8 @@ bool TcInput::keyPressed(const juce::KeyPress& key)
 void TcInput::focusOfChildComponentChanged(FocusChangeType)
 {
     guardUser([&] {
-        if (!hasKeyboardFocus(true))
-            commit(juce::sendNotification);
+        if (!hasKeyboardFocus(true) && take())
+            tell();
     });
 }
 
@@ -218,8 +226,10 @@ void TcInput::typed(Editor& editor)
         m_fields[*field + 1]->grabKeyboardFocus();
         return;
     }
+    const bool isAnother = take();
     editor.selectAll();
-    commit(juce::sendNotification);
+    if (isAnother)
+        tell();
 }
 
 bool TcInput::stepByKey(Editor& editor, const juce::KeyPress& key)
@@ -235,7 +245,7 @@ void TcInput::step(Editor& editor, bool isUp)
 {
     editor.toFront(true);
     // What was typed and not taken yet counts.
-    const bool wasTyped = m_entry.commit(texts());
+    const bool wasTyped = take();
     const std::optional<TimecodeEntry::Field> field = fieldOf(editor);
     const bool isStepped = field ? m_entry.step(*field, isUp) : m_entry.flipSign();
     showValue();
@@ -270,12 +280,11 @@ void TcInput::showValue()
     m_sign->setText(shown.sign, false);
 }
 
-void TcInput::commit(juce::NotificationType notification)
+bool TcInput::take()
 {
     const bool isAnother = m_entry.commit(texts());
     showValue();
-    if (isAnother && notification != juce::dontSendNotification)
-        tell();
+    return isAnother;
 }
 
 void TcInput::tell()

@@ -8,7 +8,7 @@
 #include <juce_gui_basics/juce_gui_basics.h>
 
 #include <array>
-#include <cstddef>
+#include <memory>
 #include <optional>
 
 namespace cadrel::gui {
@@ -46,6 +46,8 @@ public:
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;
+    /// The input is covered also when what it lies on is disabled.
+    void enablementChanged() override;
     /// Steps the field under the mouse, or flips the sign, when the input has the focus.
     void mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel) override;
     bool keyPressed(const juce::KeyPress& key) override;
@@ -63,8 +65,9 @@ private:
 
     TimecodeEntry::Texts texts() const;
     void showValue();
-    /// Takes what the editors hold. Nothing of the input may be touched afterwards, if listeners are told.
-    void commit(juce::NotificationType notification);
+    /// Takes what the editors hold, and shows the value. Whether it is another one.
+    bool take();
+    /// Nothing of the input may be touched afterwards.
     void tell();
 
     TimecodeEntry m_entry;

@@ -221,6 +221,7 @@ TEST_F(TcInputTest, BringsBackTheFormerFramesForFramesOverTheRate)
     window.type("99");
 
     EXPECT_EQ(shown(), "+01:02:03:04");
+    EXPECT_EQ(frames().getHighlightedText(), "04");
     EXPECT_TRUE(listener.heard.empty());
     EXPECT_TRUE(alerts.messages.empty());
 }
@@ -442,6 +443,17 @@ TEST_F(TcInputTest, IgnoresTheWheelAndIsCoveredWhileItIsNotActive)
     input->setActive(true);
     EXPECT_FALSE(overlay.isVisible());
     EXPECT_TRUE(input->isEnabled());
+}
+
+TEST_F(TcInputTest, IsCoveredAlsoWhenWhatItLiesOnIsDisabled)
+{
+    open(false);
+    const juce::Component& overlay = *input->getChildComponent(input->getNumChildComponents() - 1);
+
+    input->getParentComponent()->setEnabled(false);
+    EXPECT_TRUE(overlay.isVisible());
+    input->getParentComponent()->setEnabled(true);
+    EXPECT_FALSE(overlay.isVisible());
 }
 
 TEST_F(TcInputTest, TellsTheLastListenerFirstAndEachOnce)

@@ -5,6 +5,7 @@
 #include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextNotificationBase.h"
+#include "tests/support/x11/VirtualScreen.h"
 
 #include <gtest/gtest.h>
 
@@ -17,6 +18,7 @@ using cadrel::core::DataModel;
 using cadrel::core::DataModelChangeContext;
 using cadrel::gui::LookAndFeel;
 using cadrel::gui::MainGui;
+using cadrel::tests::NoScreen;
 
 namespace {
 
@@ -38,6 +40,7 @@ public:
 
 class MainGuiTest : public testing::Test {
 protected:
+    const NoScreen m_noScreen;
     juce::ScopedJuceInitialiser_GUI m_juce;
     Notifier m_notifier;
     DataModel m_model;

@@ -56,7 +56,7 @@ class Registries : public Implements<Registries, FObject, IMenuRegistry, IAction
 public:
     static constexpr const char* ClassName = "Registries";
 
-    enum class Step { Command, Handler, Factory };
+    enum class Step { Command, Handler, Factory, None };
 
     explicit Registries(Step refused) : m_refused(refused) {}
 
@@ -93,7 +93,12 @@ public:
     public:
         static constexpr const char* ClassName = "Window";
 
-        int32 open() override { return opens ? ResultOk : 7; }
+        int32 open() override
+        {
+            if (throwsAtOpen)
+                throw std::runtime_error("open");
+            return opens ? ResultOk : 7;
+        }
         int32 setCloseNotification(ICloseWindowNotification* given) override
         {
             listener = given;
@@ -102,6 +107,7 @@ public:
         int32 show(bool) override { throw std::runtime_error("window"); }
 
         bool opens = false;
+        bool throwsAtOpen = false;
         ICloseWindowNotification* listener = nullptr;
         Counted<IPlugView> view;
     };
@@ -111,6 +117,9 @@ public:
     {
         window = makeCounted<Window>();
         window->opens = opens;
+        window->throwsAtOpen = throwsAtOpen;
+        if (throws)
+            throw std::runtime_error("views");
         builder->createView(name, nullptr, window->view.out());
         if (failsAfterTheView)
             return ResultFalse;
@@ -120,6 +129,8 @@ public:
 
     Counted<Window> window;
     bool opens = false;
+    bool throws = false;
+    bool throwsAtOpen = false;
     bool failsAfterTheView = false;
 };
 
@@ -374,6 +385,53 @@ TEST_F(CadrelTest, EndsItsViewAlsoWhereAWindowOfTheHostThrows)
     EXPECT_EQ(view->getNumChildComponents(), 0);
     EXPECT_FALSE(m_cadrel->hasWindow(views->window.get()));
     EXPECT_FALSE(isRegistered());
+}
+
+TEST_F(CadrelTest, LetsNoExceptionOfTheWindowsOfAHostOut)
+{
+    const auto views = makeCounted<BrokenViews>();
+    m_context->replace(IViewManager::iid, views);
+    initialize();
+    const auto show = [this] { return m_cadrel->handleAction("Cadrel", "ShowDialog", true); };
+
+    views->throws = true;
+    EXPECT_NE(show(), ResultOk);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
+    views->throws = false;
+    views->throwsAtOpen = true;
+    EXPECT_NE(show(), ResultOk);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
+    EXPECT_EQ(views->window->listener, nullptr);
+
+    views->throwsAtOpen = false;
+    views->opens = true;
+    EXPECT_EQ(show(), ResultOk);
+    EXPECT_NE(show(), ResultOk) << "It is there, and throws when it is shown.";
+    EXPECT_TRUE(m_cadrel->hasWindow(views->window.get()));
+}
+
+TEST_F(CadrelTest, TakesItsRegistrationsBackOnceTheLastOneFirst)
+{
+    const auto registries = makeCounted<Registries>(Registries::Step::None);
+    m_context->replace(IMenuRegistry::iid, registries);
+    m_context->replace(IActionManager::iid, registries);
+    m_context->replace(IWindowFactoryRegistry::iid, registries);
+    ASSERT_EQ(initialize(), ResultOk);
+
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+    EXPECT_EQ(registries->removed, (std::vector<std::string>{"factory", "handler", "command"}));
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+    m_cadrel.reset();
+    EXPECT_EQ(registries->removed.size(), 3U);
+}
+
+TEST_F(CadrelTest, MakesNoViewBeforeItIsInitialised)
+{
+    Counted<IPlugView> view;
+    EXPECT_EQ(m_cadrel->createView("CadrelWindow", nullptr, view.out()), 4);
+    EXPECT_FALSE(view);
+    EXPECT_NE(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
 }
 
 TEST_F(CadrelTest, TitlesItsCommandInTheLanguageThatTheHostKnowsBefore)

@@ -38,6 +38,11 @@ std::string readLine(int descriptor)
 
 } // namespace
 
+NoScreen::NoScreen()
+{
+    hideOtherScreens();
+}
+
 VirtualScreen::VirtualScreen(int width, int height)
 {
     int ends[2];

@@ -8,6 +8,12 @@
 
 namespace cadrel::tests {
 
+/// This process sees no X server, even where there is one by chance.
+class NoScreen {
+public:
+    NoScreen();
+};
+
 /// An X server of its own for one test, without a window manager, with a screen of 1600 x 1000 unless told otherwise. While
 /// it lives, the environment names it as the display of this process. Without one, the process sees no server at all.
 class VirtualScreen {
