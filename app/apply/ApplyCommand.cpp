@@ -394,7 +394,7 @@ public:
             checkCuts(plausibility, runs, terminal);
         require(plausibility.doubtOfChanges(runs, !source.cuts, allowedFrames(model.settings())), options, terminal);
         remember(runs, model);
-        plan(source.cuts.has_value());
+        plan(source.cuts.has_value(), terminal);
         if (source.cuts) {
             require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options, terminal);
             m_facts.generation.emplace(model, isPlanned(source) ? m_kept->carried() : model.changeEdl(), *source.cuts,
@@ -421,7 +421,7 @@ private:
             requireChangeEvents(m_hosted.model(), m_options.generation);
     }
 
-    void plan(bool isGenerated)
+    void plan(bool isGenerated, Terminal& terminal)
     {
         DataModel& model = m_hosted.model();
         const bool isPlanned = m_options.keep == ApplyOptions::Keep::All;
@@ -431,7 +431,8 @@ private:
         if (!isPlanned)
             return;
         m_kept.emplace(model, m_hosted.project(), m_clock,
-                       isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_options.isForced, m_edls);
+                       isGenerated ? KeptRun::Source::Generated : KeptRun::Source::Given, m_edls,
+                       [&](const Failure& doubt) { require(doubt, m_options, terminal); });
         m_facts.isRunNeeded = m_kept->needsRun();
         m_facts.isHeldBack = m_kept->plan().isHeldBack;
         const Framerate framerate = Timecode::framerate();
@@ -491,7 +492,7 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
     facts.reportBackups = formerReport.names();
     std::optional<Output> report;
     if (Output::isFile(options.jsonFile)) {
-        report.emplace(options.jsonFile);
+        report.emplace(options.jsonFile, options.replacing.isAllowed);
         writeReport(*report, hosted.model(), ApplyJson(facts, clock));
         report->finish();
     }
@@ -511,7 +512,7 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
 void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyOptions& options)
 {
     if (Output::isStandardOutput(options.jsonFile)) {
-        Output output(options.jsonFile);
+        Output output(options.jsonFile, true);
         writeReport(output, facts.model, ApplyJson(facts, clock));
         output.place();
         return;

@@ -95,7 +95,7 @@ void runNotes(const NotesOptions& options, Terminal& terminal)
     if (!options.outputFile.empty())
         interruption.emplace();
     terminal.clearProgress();
-    Output output(options.outputFile.empty() ? "-" : options.outputFile);
+    Output output(options.outputFile.empty() ? "-" : options.outputFile, options.replacing.isAllowed);
     writer(document, [&output](std::string_view text) { output.write(text); });
     Backups backups(options.replacing.keepsFormer ? std::vector{options.outputFile} : std::vector<std::string>());
     output.place();

@@ -49,14 +49,14 @@ public:
         const bool isMove = step.action == StepAction::Move;
         const PictureChange& first = step.changes.front();
         const core::EventBase* const shot = first.newShot != nullptr ? first.newShot : first.oldShot;
-        const auto time = [this](std::int32_t frames) { return frames == 0 ? "" : m_words.timecode(frames); };
+        const auto time = [this](std::int32_t frames) { return frames == 0 ? "" : m_words.plainTimecode(frames); };
         const auto& notes = m_document.notes;
         const std::array<std::string, 21> cells{
             std::to_string(entry.number),
             std::to_string(reel + 1),
             std::string(wordOf(step.action)),
-            m_words.timecode(notes.timecodeOf(step.place)),
-            isMove ? m_words.timecode(notes.timecodeOf(step.from)) : "",
+            m_words.plainTimecode(notes.timecodeOf(step.place)),
+            isMove ? m_words.plainTimecode(notes.timecodeOf(step.from)) : "",
             time(step.removed),
             time(step.inserted.length),
             time(step.moved),
@@ -68,8 +68,8 @@ public:
             kindsOf(step),
             shot == nullptr ? "" : asText(shot->rollName()),
             shot == nullptr ? "" : asText(shot->clipName()),
-            first.inOld ? m_words.timecode(notes.oldTimecode(first.inOld->start)) : "",
-            first.inNew ? m_words.timecode(notes.newTimecode(first.inNew->start)) : "",
+            first.inOld ? m_words.plainTimecode(notes.oldTimecode(first.inOld->start)) : "",
+            first.inNew ? m_words.plainTimecode(notes.newTimecode(first.inNew->start)) : "",
             asText(changesOf(step)),
             NotesWording::feet(step.place.frame),
             isMove ? NotesWording::feet(step.from.frame) : ""};

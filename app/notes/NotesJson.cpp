@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "app/edl/EventWords.h"
 #include "app/notes/NotesText.h"
 #include "app/notes/NotesWording.h"
 #include "core/edl/EventBase.h"
@@ -58,17 +59,15 @@ private:
         ordered_json doubts = ordered_json::array();
         for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
             const core::EventBase& event = events.at(static_cast<std::size_t>(doubtful.event));
-            ordered_json flaws = ordered_json::array();
-            for (const std::int32_t flaw : event.flaws())
-                flaws.push_back(wordOfFlaw(flaw));
             ordered_json doubt = shotJson(&event);
             doubt["doubt"] = wordOf(doubtful.doubt);
-            doubt["flaws"] = std::move(flaws);
+            doubt["flaws"] = flawWordsOf(event);
             doubts.push_back(std::move(doubt));
         }
         return {{"files", isNew ? m_document.cuts.newNames : m_document.cuts.oldNames},
                 {"events", events.size()},
                 {"invalid", events.countInvalid()},
+                {"unread", toJson(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread)},
                 {"doubts", std::move(doubts)}};
     }
 
@@ -98,7 +97,8 @@ private:
     {
         if (!reel)
             return nullptr;
-        return {{"start", m_words.timecode(cut.reels()[*reel].timecodeStart)}, {"frames", cut.reels()[*reel].length}};
+        return {{"start", m_words.plainTimecode(cut.reels()[*reel].timecodeStart)},
+                {"frames", cut.reels()[*reel].length}};
     }
 
     void writeReel(std::size_t index, const NotesSink& sink) const
@@ -119,8 +119,8 @@ private:
     {
         const core::KeptStretch& kept = *entry.kept();
         return {{"row", "kept"},
-                {"oldIn", m_words.timecode(m_document.notes.oldTimecode(kept.oldStart))},
-                {"newIn", m_words.timecode(m_document.notes.newTimecode(kept.newStart))},
+                {"oldIn", m_words.plainTimecode(m_document.notes.oldTimecode(kept.oldStart))},
+                {"newIn", m_words.plainTimecode(m_document.notes.newTimecode(kept.newStart))},
                 {"frames", kept.length},
                 {"offsetFrames",
                  m_document.notes.newTimecode(kept.newStart) - m_document.notes.oldTimecode(kept.oldStart)}};
@@ -129,7 +129,7 @@ private:
     ordered_json placeJson(const core::WorkPlace& place) const
     {
         ordered_json json{{"reel", place.reel + 1},
-                          {"timecode", m_words.timecode(m_document.notes.timecodeOf(place))},
+                          {"timecode", m_words.plainTimecode(m_document.notes.timecodeOf(place))},
                           {"frame", place.frame}};
         if (m_document.showsFeet)
             json["feet"] = NotesWording::feet(place.frame);
@@ -146,7 +146,7 @@ private:
                           {"deleteFrames", step.removed},
                           {"insertFrames", step.inserted.length}};
         if (step.inserted.length > 0)
-            json["insertFrom"] = m_words.timecode(m_document.notes.newTimecode(step.inserted.start));
+            json["insertFrom"] = m_words.plainTimecode(m_document.notes.newTimecode(step.inserted.start));
         if (step.action == core::StepAction::Move) {
             json["from"] = placeJson(step.from);
             json["moveFrames"] = step.moved;
@@ -173,10 +173,10 @@ private:
         if (change.newShot != nullptr)
             json["newShot"] = shotJson(change.newShot);
         if (change.inOld)
-            json["old"] = {{"in", m_words.timecode(m_document.notes.oldTimecode(change.inOld->start))},
+            json["old"] = {{"in", m_words.plainTimecode(m_document.notes.oldTimecode(change.inOld->start))},
                            {"frames", change.inOld->length}};
         if (change.inNew)
-            json["new"] = {{"in", m_words.timecode(m_document.notes.newTimecode(change.inNew->start))},
+            json["new"] = {{"in", m_words.plainTimecode(m_document.notes.newTimecode(change.inNew->start))},
                            {"frames", change.inNew->length}};
         if (change.shots > 1)
             json["shots"] = change.shots;
@@ -193,9 +193,7 @@ private:
                 {"srcIn", shot->srcIn().toString()},
                 {"srcOut", shot->srcOut().toString()},
                 {"speed", shot->signedSpeed()},
-                {"transition", shot->transitionType() == core::TransitionType::Wipe ? "wipe"
-                               : shot->isTransition()                               ? "dissolve"
-                                                                                    : "cut"},
+                {"transition", transitionWordOf(*shot)},
                 {"transitionFrames", shot->transitionDuration()},
                 {"edlFile", shot->edlFileName()}};
     }

@@ -34,21 +34,20 @@ std::string trimmedEnd(std::string line)
     return line + "\n";
 }
 
-/// Broken at blanks where it is too long; the further lines are indented.
-std::string wrapped(const std::string& text, const std::string& indent)
+/// Broken at blanks where it is too long; the further lines are indented by more.
+std::string wrapped(const std::string& text)
 {
-    std::string lines;
-    std::string line;
     const auto widthOf = [](const std::string& part) { return toPrintable(part).width; };
+    std::string lines;
+    std::string line = " ";
     for (std::size_t start = 0; start <= text.size();) {
         const std::size_t end = std::min(text.find(' ', start), text.size());
         const std::string word = text.substr(start, end - start);
-        if (!line.empty() && widthOf(line) + 1 + widthOf(word) > Width) {
+        if (widthOf(line) + 1 + widthOf(word) > Width) {
             lines += line + "\n";
-            line = indent + word;
-        } else {
-            line += (line.empty() ? "" : " ") + word;
+            line = std::string(3, ' ');
         }
+        line.append(" ").append(word);
         start = end + 1;
     }
     return lines + line + "\n";
@@ -62,6 +61,7 @@ public:
     {
         sink(head());
         sink(largest());
+        sink(reels());
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
             sink(concatenated({"\n", m_words.reelTitle(reel), "\n", m_words.reelLengths(reel), "\n\n"}));
             sink(trimmedEnd(padded("step", Indent.size()) + padded("at", 13) + padded("what to do", ActionWidth + 1) +
@@ -97,10 +97,24 @@ private:
             return "\nNothing has changed.\n";
         std::string text = "\nThe largest changes\n";
         for (const NoteEntry* const entry : steps) {
-            const ChangeWords words = m_words.describe(NotesWording::largestChange(*entry));
             text += trimmedEnd(padded(numberText(entry->number), Indent.size()) +
-                               padded(m_words.action(*entry), ActionWidth) + toPrintable(words.shot, 39).text);
+                               padded(m_words.action(*entry), ActionWidth) + m_words.shotsOf(*entry));
         }
+        return text;
+    }
+
+    /// A line a reel where there are several.
+    std::string reels() const
+    {
+        const auto& all = m_document.notes.reels();
+        if (all.size() < 2)
+            return {};
+        std::string text = "\nThe reels\n  reel  begins       before       after        change        steps\n";
+        for (std::size_t reel = 0; reel < all.size(); ++reel)
+            text += numberText(reel + 1) + "    " + m_words.reelStart(reel) + "  " +
+                    m_words.timecode(all[reel].before) + "  " + m_words.timecode(all[reel].after) + " " +
+                    m_words.change(all[reel].after - all[reel].before) + "  " + numberText(m_words.stepsOf(reel)) +
+                    "\n";
         return text;
     }
 
@@ -141,7 +155,7 @@ private:
             return {};
         std::string text = "\nHealed, doubted and passed over\n";
         for (const std::string& line : lines)
-            text += wrapped("  " + line, "    ");
+            text += wrapped(line);
         return text;
     }
 

@@ -4,6 +4,7 @@
 
 #include "app/console/Failure.h"
 
+#include <algorithm>
 #include <cairo-pdf.h>
 
 namespace cadrel::app {
@@ -49,6 +50,12 @@ double PdfPages::widthOf(const std::string& utf8)
     return extents.x_advance;
 }
 
+double PdfPages::widthOf(const std::string& utf8, const PdfFont& font)
+{
+    set(font, {});
+    return widthOf(utf8);
+}
+
 void PdfPages::text(double x, double y, const std::string& utf8, const PdfFont& font, const PdfColour& colour)
 {
     set(font, colour);
@@ -76,6 +83,22 @@ std::string PdfPages::fitting(const std::string& utf8, const PdfFont& font, doub
             cut.pop_back();
     }
     return cut + "…";
+}
+
+std::vector<std::string> PdfPages::wrapped(const std::string& utf8, const PdfFont& font, double width)
+{
+    set(font, {});
+    std::vector<std::string> lines;
+    for (std::size_t start = 0; start <= utf8.size();) {
+        const std::size_t end = std::min(utf8.find(' ', start), utf8.size());
+        const std::string word = utf8.substr(start, end - start);
+        if (lines.empty() || widthOf(lines.back() + " " + word) > width)
+            lines.push_back(fitting(word, font, width));
+        else
+            lines.back().append(" ").append(word);
+        start = end + 1;
+    }
+    return lines;
 }
 
 void PdfPages::box(double x, double y, double width, double height, const PdfColour& colour)

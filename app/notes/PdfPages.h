@@ -7,6 +7,7 @@
 #include <cairo.h>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace cadrel::app {
 
@@ -38,8 +39,11 @@ public:
     /// `y` is that of the base line.
     void text(double x, double y, const std::string& utf8, const PdfFont& font, const PdfColour& colour);
     void textToRight(double right, double y, const std::string& utf8, const PdfFont& font, const PdfColour& colour);
+    double widthOf(const std::string& utf8, const PdfFont& font);
     /// The text as it fits into the width, with an ellipsis where it is cut.
     std::string fitting(const std::string& utf8, const PdfFont& font, double width);
+    /// The text in lines that fit into the width, broken at blanks; a word that is wider ends with an ellipsis.
+    std::vector<std::string> wrapped(const std::string& utf8, const PdfFont& font, double width);
     void box(double x, double y, double width, double height, const PdfColour& colour);
     /// A band with curved sides from a stretch above to one below.
     void band(double topLeft, double topRight, double top, double bottomLeft, double bottomRight, double bottom,

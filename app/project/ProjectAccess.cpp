@@ -47,11 +47,6 @@ Failure writingFailure(const ProjectFileError& error, const std::string& file)
     return fault == "can't be written" ? unwritable({file}) : Failure{file, fault, "correct the project"};
 }
 
-Failure changedFailure(const standin::ProjectFileChanged& error, const std::string& file)
-{
-    return {file, faultIn(error, file), "look at what it has written, and run again"};
-}
-
 ProjectClock clockOf(const standin::Project& project, const std::string& file)
 {
     try {

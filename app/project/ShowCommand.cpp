@@ -96,7 +96,7 @@ void writeJson(Project& project, const ProjectClock& clock, const StoredModel& s
     std::optional<Interruption> interruption;
     if (!Output::isStandardOutput(options.jsonFile))
         interruption.emplace();
-    Output json(options.jsonFile);
+    Output json(options.jsonFile, options.isReplacing);
     ProjectJson(project, clock, stored, [&json](std::string_view text) {
         json.write(text);
     }).write(fileNameOf(options.projectFile), tracks);

@@ -184,7 +184,8 @@ private:
     util::Result::Type runCadrel();
     util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                   std::uint32_t options);
-    util::Result::Type finishPreview(const EntryName& name);
+    /// With `leaving` the preview is switched off afterwards, also when it fails.
+    util::Result::Type finishPreview(bool leaving);
     /// Tells the user when his lock has kept the new video from its track.
     static void tellOfVideo(bool isWritten);
 

@@ -97,8 +97,6 @@ Result::Type Host::removeVirginTerritoryMarkers()
     Project* const project = engineProject();
     if (!project)
         return Result::NoProject;
-    // What is no longer in the preview stretch isn't followed any more either.
-    project->previewEvents().clear();
     project->clearPreview(openTransaction());
     project->startWriting();
     return Result::Ok;

@@ -230,7 +230,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
     });
 }
 
-Result::Type Host::finishPreview(const EntryName& name)
+Result::Type Host::finishPreview(bool leaving)
 {
     const std::shared_ptr<Project> held = m_currentProject;
     if (!held)
@@ -240,14 +240,20 @@ Result::Type Host::finishPreview(const EntryName& name)
         project.previewEvents().clear();
         return Result::Ok;
     }
-    return edit(project, name, [&](IEditTransaction& transaction) {
-        project.previewEvents().clear();
-        core::EditTransactionHandle handle(transaction);
-        // A named change that goes on has a snapshot of the model from before.
-        const auto command = namedEdit(project.document()) ? nullptr : createCommand(handle);
-        m_videoProvider->apply(false, transaction, project.previewOffset());
-        requireSuccess(CadrelerBase::endPreview());
-        project.resetPreviewOffset();
+    return edit(project, leaving ? EndPreview : DeletePreviewRange, [&](IEditTransaction& transaction) {
+        FirstFailure failure;
+        failure.ofStep([&] {
+            core::EditTransactionHandle handle(transaction);
+            // A named change that goes on has a snapshot of the model from before.
+            const auto command = namedEdit(project.document()) ? nullptr : createCommand(handle);
+            m_videoProvider->apply(false, transaction, project.previewOffset());
+            requireSuccess(CadrelerBase::endPreview());
+            project.resetPreviewOffset();
+        });
+        // No memo follows what is left of it.
+        if (leaving)
+            project.previewEvents().clear();
+        failure.raise();
     });
 }
 
@@ -371,7 +377,7 @@ Result::Type Host::endPreview()
     std::optional<LoweredPreviewFlag> lowered;
     if (held && m_restorePreviewState)
         lowered.emplace(held->model());
-    const Result::Type result = finishPreview(DeletePreviewRange);
+    const Result::Type result = finishPreview(false);
     lowered.reset();
     tellDropped(dropped);
     return result;
@@ -394,7 +400,7 @@ void Host::setPreviewActive(bool active)
     }
     if (wasActive && !active) {
         failure.ofStep([&] { restoreCycles(project); });
-        failure.ofStep([&] { requireSuccess(finishPreview(EndPreview)); });
+        failure.ofStep([&] { requireSuccess(finishPreview(true)); });
     }
     if (!wasActive && active)
         m_restorePreviewState = true;
@@ -406,6 +412,7 @@ void Host::setPreviewActive(bool active)
         model.notifyPreviewState();
     });
     if (!active) {
+        project.previewEvents().clear();
         failure.ofStep([&] { project.findLockedTracks(); });
         failure.ofStep([&] { project.setTracksLocked(false); });
         project.releaseLockTracks();

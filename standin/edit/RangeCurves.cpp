@@ -71,6 +71,17 @@ PointsAround pointsAround(const Envelope& curve, double start, double end)
     return around;
 }
 
+/// Copies of the points of a range up to before its end, at times from its start.
+CurvePoints pointsBeforeEnd(const Envelope& curve, const PointsAround& around, double start)
+{
+    CurvePoints points;
+    points.push_back(around.atStart.empty() ? makeHoldingPoint(0.0, *curve.valueBehind(start))
+                                            : copyOf(around.atStart.back(), 0.0));
+    for (const Counted<AutomationPoint>& point : around.within)
+        points.push_back(copyOf(point, point->start() - start));
+    return points;
+}
+
 /// Whether a curve runs the same without a point that stands between two others, or beside the one that there is.
 bool isNeedless(const AutomationPoint* before, const AutomationPoint& point, const AutomationPoint* behind)
 {
@@ -111,15 +122,26 @@ Counted<AutomationPoint> firstWithValue(const PointsAround& around, double value
 CurvePoints readCurve(const Envelope& curve, double start, double end)
 {
     const PointsAround around = pointsAround(curve, start, end);
-    CurvePoints points;
     if (!curve.firstChild())
-        return points;
-    points.push_back(around.atStart.empty() ? makeHoldingPoint(0.0, *curve.valueBehind(start))
-                                            : copyOf(around.atStart.back(), 0.0));
-    for (const Counted<AutomationPoint>& point : around.within)
-        points.push_back(copyOf(point, point->start() - start));
-    const double last = around.atEnd.empty() ? *curve.valueBefore(end) : around.atEnd.front()->value();
-    points.push_back(makeHoldingPoint(end - start, last));
+        return {};
+    CurvePoints points = pointsBeforeEnd(curve, around, start);
+    // Where the curve steps, the first point of the step belongs to what is before it.
+    if (around.atEnd.size() > 1) {
+        points.push_back(copyOf(around.atEnd.front(), end - start));
+    } else {
+        const double last = around.atEnd.empty() ? *curve.valueBefore(end) : around.atEnd.front()->value();
+        points.push_back(makeHoldingPoint(end - start, last));
+    }
+    return points;
+}
+
+CurvePoints readRest(const Envelope& written, double start)
+{
+    const auto last = Counted<AutomationPoint>::share(static_cast<AutomationPoint*>(written.lastChild()));
+    if (!last)
+        return {};
+    CurvePoints points = pointsBeforeEnd(written, pointsAround(written, start, last->start()), start);
+    points.push_back(copyOf(last, last->start() - start));
     return points;
 }
 

@@ -34,6 +34,9 @@ using CurvePoints = std::vector<Velmark::Counted<AutomationPoint>>;
 /// the last stand at its edges. Empty for a curve without points.
 CurvePoints readCurve(const Envelope& curve, double start, double end);
 
+/// The same of a curve that has got the points of such a range, from `start` to the last of them, which stays as it is.
+CurvePoints readRest(const Envelope& written, double start);
+
 /// Replaces what the curve has from `start` to `end` by points as readCurve gives them, which become its own. Without any the
 /// range is cleared.
 void replaceCurve(Envelope& curve, double start, double end, const CurvePoints& points);

@@ -5,10 +5,9 @@
 #include "standin/edit/RangeCurves.h"
 #include "standin/project/Event.h"
 #include "standin/project/Project.h"
+#include "standin/project/Seams.h"
 
 #include <algorithm>
-#include <cstdint>
-#include <unordered_map>
 
 using namespace Velmark;
 
@@ -65,21 +64,6 @@ void clearEvents(Track& track, double start, double end)
     }
 }
 
-/// Those on a track that may be pieces of one event, in order.
-using Pieces = std::vector<Counted<Event>>;
-
-/// Null when none of the pieces goes on where this one ends.
-Event* continuationOf(const Event& event, const Pieces& pieces)
-{
-    auto piece = std::ranges::partition_point(
-        pieces, [&](const Counted<Event>& other) { return other->start() <= event.end() - SameInstant; });
-    for (; piece != pieces.end() && (*piece)->start() < event.end() + SameInstant; ++piece) {
-        if (piece->get() != &event && (*piece)->parent() && event.isContinuedBy(**piece))
-            return piece->get();
-    }
-    return nullptr;
-}
-
 } // namespace
 
 RangeContent::RangeContent(const Project& project, const std::vector<Track*>& tracks, double start, double end)
@@ -116,7 +100,7 @@ void RangeContent::writeAt(double destination) const
         clearEvents(*track, start, end);
         copyEvents(*content, from, m_length, *track, start);
         for (const auto& [number, curve] : track->curves())
-            replaceCurve(*curve, start, end, readCurve(content->curve(number), from, m_length));
+            replaceCurve(*curve, start, end, readRest(content->curve(number), from));
     }
 }
 
@@ -136,18 +120,19 @@ bool joinPieces(const std::vector<Track*>& tracks, double start, double end)
 {
     bool joined = false;
     for (Track* const track : tracks) {
-        Pieces events;
-        std::unordered_map<std::uint64_t, Pieces> piecesOf;
+        std::vector<Counted<Event>> events;
+        Seams heads;
         // What goes on at the end begins less than two instants after it.
         track->visitTouching(start - SameInstant, end + 2.0 * SameInstant, [&](Node& child) {
-            events.push_back(Counted<Event>::share(static_cast<Event*>(&child)));
-            piecesOf[events.back()->origin()].push_back(events.back());
+            auto& event = static_cast<Event&>(child);
+            events.push_back(Counted<Event>::share(&event));
+            heads.add(event.head(), event);
         });
         for (const Counted<Event>& event : events) {
-            const Pieces& pieces = piecesOf[event->origin()];
+            const auto goesOnIn = [&](const Event& next) { return &next != event.get() && event->isContinuedBy(next); };
             // Those to the left may have taken it in.
             while (event->parent() && event->end() > start - SameInstant && event->end() < end + SameInstant) {
-                Event* const next = continuationOf(*event, pieces);
+                Event* const next = heads.take(event->tail(), goesOnIn);
                 if (!next)
                     break;
                 event->join(*next);

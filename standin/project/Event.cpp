@@ -62,9 +62,11 @@ Counted<Event> Event::cutOut(double start, double end) const
 bool Event::isContinuedBy(const Event& next) const
 {
     const auto isSame = [](double a, double b) { return std::abs(a - b) < SameInstant; };
-    return m_origin == next.m_origin && typeid(*this) == typeid(next) && isSame(end(), next.start()) &&
-           isSame(m_originOffset + length(), next.m_originOffset) && name() == next.name() &&
-           attributes() == next.attributes() && sourceRunsOn(next);
+    const Seam end = tail();
+    const Seam begin = next.head();
+    return end.origin == begin.origin && typeid(*this) == typeid(next) && isSame(end.time, begin.time) &&
+           isSame(end.offset, begin.offset) && name() == next.name() && attributes() == next.attributes() &&
+           sourceRunsOn(next);
 }
 
 void Event::join(Event& next)

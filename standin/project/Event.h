@@ -32,8 +32,15 @@ public:
     /// A new event, not inserted: this one cut to `start` to `end`, which are seconds in its container and lie within it. It
     /// stands at `start`. All travels with it: name, attributes, selection, source offset, the content of a part.
     Velmark::Counted<Event> cutOut(double start, double end) const;
-    /// The same number for all pieces of one event, and for them alone.
-    std::uint64_t origin() const { return m_origin; }
+    /// Where a piece of an event begins or ends: in its container, and in the event before it was cut, in seconds. The
+    /// origin is the same number for all pieces of one event, and for them alone.
+    struct Seam {
+        std::uint64_t origin;
+        double time;
+        double offset;
+    };
+    Seam head() const { return {m_origin, start(), m_originOffset}; }
+    Seam tail() const { return {m_origin, end(), m_originOffset + length()}; }
     /// Whether `next`, which has to begin where this one ends, is a piece of the same event and the one that followed in it,
     /// with equal name and attributes.
     bool isContinuedBy(const Event& next) const;

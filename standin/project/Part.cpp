@@ -3,11 +3,11 @@
 #include "standin/project/Part.h"
 
 #include "standin/project/ClipEvent.h"
+#include "standin/project/Seams.h"
 
 #include <algorithm>
 #include <limits>
 #include <string_view>
-#include <vector>
 
 using namespace Velmark;
 
@@ -55,17 +55,20 @@ bool Part::sourceRunsOn(const Event& /*next*/) const
 
 void Part::takeContent(Event& next, double offset)
 {
-    std::vector<Event*> ends;
-    visitTouching(offset - SameInstant, offset + SameInstant,
-                  [&](Node& child) { ends.push_back(static_cast<Event*>(&child)); });
+    Seams ends;
+    visitTouching(offset - SameInstant, offset + SameInstant, [&](Node& child) {
+        auto& event = static_cast<Event&>(child);
+        ends.add(event.tail(), event);
+    });
     while (Node* const child = next.firstChild()) {
         auto& event = static_cast<Event&>(*child);
         event.insertInto(*this);
         event.setSpan(offset + event.start(), offset + event.end());
-        const auto before =
-            std::find_if(ends.begin(), ends.end(), [&](const Event* end) { return end->isContinuedBy(event); });
-        if (before != ends.end())
-            (*before)->join(event);
+        Event* const before = ends.take(event.head(), [&](const Event& end) { return end.isContinuedBy(event); });
+        if (!before)
+            continue;
+        before->join(event);
+        ends.add(before->tail(), *before);
     }
 }
 

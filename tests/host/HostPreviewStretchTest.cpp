@@ -18,8 +18,11 @@
 
 #include <algorithm>
 #include <functional>
+#include <initializer_list>
 #include <string>
 #include <string_view>
+#include <utility>
+#include <vector>
 
 namespace cadrel::host::tests {
 namespace {
@@ -56,7 +59,21 @@ protected:
         ASSERT_EQ(host.contentOf(track).size(), 4U);
     }
 
+    /// The track of the memos, with some at a time.
+    void addMemos(std::initializer_list<std::pair<const char16_t*, double>> points)
+    {
+        memos = host.addTrack(TypeWord::Marker, u"Memos");
+        memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
+        for (const auto& [name, time] : points)
+            host.addPointMarker(memos, name, host.inHost(time));
+    }
+    void rename(const Node& event, const char16_t* name)
+    {
+        host.edit(u"Rename", [&] { event->setName(nullptr, standin::tests::text(name).get(), 0); });
+    }
+
     const Texts film{"one 0-10", "two 10-20"};
+    Node memos;
 };
 
 INSTANTIATE_TEST_SUITE_P(Origins, HostPreviewStretchTest, testing::Values(0.0, 3600.0));
@@ -353,9 +370,7 @@ TEST_P(HostPreviewStretchTest, TakesAwayNothingForAnAttributeThatMakesNoSense)
 
 TEST_P(HostPreviewStretchTest, LeavesAMemoThatTheUserHasWrittenWhereTheNewCutHasNothing)
 {
-    const Node memos = host.addTrack(TypeWord::Marker, u"Memos");
-    memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
-    host.addPointMarker(memos, u"click", host.inHost(6.0));
+    addMemos({{u"click", 6.0}});
     adapter().setPreviewActive(true);
     host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
     host.idle();
@@ -368,42 +383,111 @@ TEST_P(HostPreviewStretchTest, LeavesAMemoThatTheUserHasWrittenWhereTheNewCutHas
     EXPECT_EQ(host.contentOf(memos), (Texts{"too loud 2-2", "click 6-6", "needs sound 86404-86404"}));
 }
 
-TEST_P(HostPreviewStretchTest, LeavesOfCopiesOutsideOfTheNewCutThoseToWhichTheUserHasGivenAName)
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasTakenToWhereTheNewCutHasNothing)
 {
-    const Node memos = host.addTrack(TypeWord::Marker, u"Memos");
-    memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true);
-    host.addPointMarker(memos, u"click", host.inHost(6.0));
-    host.addPointMarker(memos, u"pop", host.inHost(7.0));
+    addMemos({{u"click", 6.0}, {u"pop", 7.0}});
     adapter().setPreviewActive(true);
     host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
     host.idle();
-    const auto moveAndName = [&](std::size_t index, double time, const char16_t* name) {
+    const auto move = [&](std::size_t index, double time) {
         const Node copy = standin::tests::childrenOf(*memos)[index];
-        host.edit(u"Edit", [&] {
-            copy->setStart(nullptr, 0, Day + host.inHost(time));
-            copy->setName(nullptr, standin::tests::text(name).get(), 0);
-        });
+        host.edit(u"Move", [&] { copy->setStart(nullptr, 0, Day + host.inHost(time)); });
+        return copy;
     };
     ASSERT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop 7-7", "click 86416-86416", "pop 86417-86417"}));
-    moveAndName(3, 5.0, u"pop is too loud");
-    moveAndName(3, 4.0, u"click"); // the other one has taken its place
+    rename(move(3, 5.0), u"pop is too loud");
+    move(3, 4.0); // the other one has taken its place
     // One that was pasted.
     FVariant id;
     requireOk(standin::tests::childrenOf(*memos)[0]->getAttribute(AttributeKey::EventUserId, id));
     const Node pasted = host.addPointMarker(memos, u"pasted", Day + host.inHost(3.0));
     requireOk(pasted->setAttribute(AttributeKey::EventUserId, id, true));
-    ASSERT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop 7-7", "pasted 86403-86403", "click 86404-86404",
-                                            "pop is too loud 86405-86405"}));
+    const Texts all{"click 6-6", "pop 7-7", "pasted 86403-86403", "click 86404-86404", "pop is too loud 86405-86405"};
+    ASSERT_EQ(host.contentOf(memos), all);
 
     adapter().setPreviewActive(false);
 
-    EXPECT_EQ(host.contentOf(memos),
-              (Texts{"click 6-6", "pop 7-7", "pasted 86403-86403", "pop is too loud 86405-86405"}));
+    EXPECT_EQ(host.contentOf(memos), all);
+}
+
+TEST_P(HostPreviewStretchTest, TakesCopiesAwayWhoseMemosHaveFollowedThemAndWereRenamedSince)
+{
+    const std::vector<std::pair<const char*, std::function<void()>>> ends{
+        {"ended", [&] { adapter().setPreviewActive(false); }},
+        {"emptied", [&] { EXPECT_EQ(adapter().endPreview(), Result::Ok); }},
+        {"replaced", [&] { host.preview(secondChange()); }},
+        {"carried over",
+         [&] {
+             host.conform();
+             ASSERT_TRUE(host.undo());
+             host.idle();
+             adapter().setPreviewActive(false);
+         }},
+        {"saved",
+         [&] {
+             reopen();
+             adapter().setPreviewActive(false);
+         }},
+        {"refused at first", [&] {
+             const auto edits = makeCounted<AlteredEdits>(host.context());
+             edits->deletes = false;
+             host.altered.replace(IEditService::iid, edits);
+             EXPECT_EQ(adapter().endPreview(), Result::HostCallFailed);
+             host.altered.unhide(IEditService::iid);
+             EXPECT_EQ(adapter().endPreview(), Result::Ok);
+         }}};
+    addMemos({{u"click", 6.0}});
+    const Node hiss = host.addRangeMarker(memos, u"hiss", host.inHost(2.0), host.inHost(4.0));
+    for (const auto& [how, end] : ends) {
+        SCOPED_TRACE(how);
+        adapter().setPreviewActive(true);
+        host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+        host.idle();
+        const std::vector<Node> all = standin::tests::childrenOf(*memos);
+        ASSERT_EQ(host.contentOf(memos), (Texts{"hiss 2-4", "click 6-6", "hiss 86412-86414", "click 86416-86416"}));
+        host.edit(u"Trim", [&] { all[2]->setEnd(nullptr, 0, Day + host.inHost(13.0)); });
+        host.edit(u"Move", [&] { all[3]->setStart(nullptr, 0, Day + host.inHost(17.0)); });
+        rename(all[0], u"hum");
+        rename(all[1], u"tick");
+        ASSERT_EQ(host.contentOf(memos), (Texts{"hum 2-3", "tick 7-7", "hiss 86412-86413", "click 86417-86417"}));
+
+        end();
+
+        EXPECT_EQ(host.contentOf(memos), (Texts{"hum 2-3", "tick 7-7"}));
+        adapter().setPreviewActive(false);
+        while (host.contentOf(memos) != Texts{"hiss 2-4", "click 6-6"})
+            ASSERT_TRUE(host.undo());
+    }
+}
+
+TEST_P(HostPreviewStretchTest, LeavesACopyThatIsMovedWhenNothingFollowsItAnyMoreAsItsEndHasFailed)
+{
+    addMemos({{u"click", 6.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->deletes = false;
+    host.altered.replace(IEditService::iid, edits);
+    EXPECT_EQ(thrownBy([&] { adapter().setPreviewActive(false); }), Result::HostCallFailed);
+    host.altered.unhide(IEditService::iid);
+    host.idle();
+    const Node click = standin::tests::childrenOf(*memos)[1];
+    host.edit(u"Move", [&] { click->setStart(nullptr, 0, Day + host.inHost(17.0)); });
+    ASSERT_EQ(host.contentOf(memos), (Texts{"click 6-6", "click 86417-86417"}));
+
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 6-6", "click 86417-86417"}));
 }
 
 // The begin of the clock.
 
-TEST(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHangsOver)
+class HostPreviewAtTheBeginOfTheClock : public AtEachOrigin {};
+
+INSTANTIATE_TEST_SUITE_P(Origins, HostPreviewAtTheBeginOfTheClock, testing::Values(0.0, 3600.0));
+
+TEST_P(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHangsOver)
 {
     using Spans = std::vector<Span>;
     struct Case {
@@ -414,15 +498,17 @@ TEST(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHan
     };
     // Of the clip, four frames stand before the source.
     for (const Case& at :
-         {Case{"00:00:00:00", "00:00:04:21", {0.0, 4.84}, 0.16}, Case{"00:00:00:03", "00:00:04:24", {0.0, 4.96}, 0.04},
-          Case{"00:00:00:04", "00:00:05:00", {0.0, 5.0}, 0.0}, Case{"00:00:00:05", "00:00:05:01", {0.04, 5.04}, 0.0}}) {
+         {Case{":00:00:00", ":00:04:21", {0.0, 4.84}, 0.16}, Case{":00:00:03", ":00:04:24", {0.0, 4.96}, 0.04},
+          Case{":00:00:04", ":00:05:00", {0.0, 5.0}, 0.0}, Case{":00:00:05", ":00:05:01", {0.04, 5.04}, 0.0}}) {
         SCOPED_TRACE(at.dstIn);
-        AdaptedHost host(0.0);
+        const auto clock = [](const char* time) { return (GetParam() == 0.0 ? "00" : "01") + std::string(time); };
+        AdaptedHost host(GetParam());
         const Node track = host.addTrack(TypeWord::Audio, u"DX");
         host.addClip(track, u"one", 10.0, 20.0);
         host.switchMarkersOff();
         host.settings().setIncludeOverhangingAudioEvents(true);
-        host.carryOver("00:00:10:04", "00:00:15:00", at.dstIn, at.dstOut);
+        host.carryOver(clock(":00:10:04").c_str(), clock(":00:15:00").c_str(), clock(at.dstIn).c_str(),
+                       clock(at.dstOut).c_str());
         const auto expectSpans = [&](const Spans& expected) {
             const auto events = standin::tests::childrenOf(*track);
             ASSERT_EQ(events.size(), expected.size());
@@ -441,9 +527,32 @@ TEST(HostPreviewAtTheBeginOfTheClock, TakesAlongWhatThereIsRoomForOfAClipThatHan
         expectSpans({{10.0, 20.0}});
 
         host.conform();
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
         expectSpans({at.written});
         EXPECT_NEAR(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), at.sourceOffset, 1e-6);
     }
+}
+
+TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheBeginOfTheHostsTimeline)
+{
+    // Where the clock begins later than at 0, an event can lie before it.
+    AdaptedHost host(3600.0);
+    const Node track = host.addTrack(TypeWord::Audio, u"DX");
+    host.addClip(track, u"one", 10.0, 20.0);
+    host.switchMarkersOff();
+    host.settings().setCreateDestinationMarkers(GetParam() == 0.0);
+    host.carryOver("01:00:10:00", "01:00:20:00", "00:59:56:00", "01:00:06:00");
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(host.undoNames().back(), u"Preview");
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 10-20", "one 86400-86406"}));
+    host.adapter().setPreviewActive(false);
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    EXPECT_EQ(host.contentOf(track), Texts{"one 0-6"});
+    EXPECT_EQ(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), 4.0);
 }
 
 // Locks.

@@ -725,6 +725,24 @@ TEST_P(HostRunTest, DoesNothingMoreOnceItIsCancelled)
     EXPECT_FALSE(host.trackNamed(u"New Video")) << "The first event was carried over, and that was all.";
 }
 
+TEST_P(HostRunTest, IsCompleteWhereTheNewVideoBeginsBeforeATimeOriginThatHasMoved)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:00:00"), core::Timecode("00:00:20:00")),
+        false);
+    host.project.setTimeOrigin(3606.0);
+    host.idle();
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    const auto events = standin::tests::childrenOf(*host.trackNamed(u"New Video"));
+    ASSERT_EQ(events.size(), 1U);
+    EXPECT_EQ(events[0]->getStart(nullptr), 0.0);
+    EXPECT_EQ(events[0]->getEnd(nullptr), 14.0);
+    EXPECT_EQ(events[0]->getSourceOffset(nullptr), 6.0);
+}
+
 TEST_P(HostRunTest, SeesNoTrackAnyMoreThatItsUndoTakesAway)
 {
     Tracks seen;

@@ -7,16 +7,21 @@
 #include "host/track/Instant.h"
 #include "host/track/Marker.h"
 #include "host/track/Track.h"
+#include "util/Result.h"
 
 #include <algorithm>
+#include <bit>
 #include <cmath>
-#include <iterator>
+#include <cstddef>
+#include <functional>
 #include <limits>
-#include <span>
+#include <numeric>
+#include <optional>
 #include <utility>
 
 using cadrel::core::SecondsRange;
 using Velmark::IEditTransaction;
+using Velmark::IHostContext;
 
 namespace cadrel::host {
 
@@ -24,38 +29,100 @@ namespace cadrel::host {
 struct PlacedMemo {
     HostEvent event;
     SecondsRange span;
+    std::int64_t id;
 };
+
+namespace {
+
+/// Numbers in an order, of which the highest of any stretch is found at once.
+class Highest {
+public:
+    static constexpr double None = -std::numeric_limits<double>::infinity();
+
+    explicit Highest(const std::vector<double>& numbers)
+        : m_leaves(std::bit_ceil(std::max<std::size_t>(numbers.size(), 1))), m_tree(2 * m_leaves, None)
+    {
+        std::ranges::copy(numbers, m_tree.begin() + static_cast<std::ptrdiff_t>(m_leaves));
+        for (std::size_t node = m_leaves - 1; node > 0; --node)
+            m_tree[node] = std::max(m_tree[2 * node], m_tree[2 * node + 1]);
+    }
+
+    /// Of those from `first` up to `last`; None when there are none.
+    double among(std::size_t first, std::size_t last) const
+    {
+        double highest = None;
+        for (first += m_leaves, last += m_leaves; first < last; first /= 2, last /= 2) {
+            if (first % 2 != 0)
+                highest = std::max(highest, m_tree[first++]);
+            if (last % 2 != 0)
+                highest = std::max(highest, m_tree[--last]);
+        }
+        return highest;
+    }
+    /// Gives each index up to `last` at which the number is that high, in order.
+    template <class Visit>
+    void visit(double least, std::size_t last, const Visit& visit) const
+    {
+        descend(1, 0, m_leaves, least, last, visit);
+    }
+
+private:
+    template <class Visit>
+    void descend(std::size_t node, std::size_t first, std::size_t count, double least, std::size_t last,
+                 const Visit& visit) const
+    {
+        if (first >= last || m_tree[node] < least)
+            return;
+        if (count == 1)
+            return visit(first);
+        descend(2 * node, first, count / 2, least, last, visit);
+        descend(2 * node + 1, first + count / 2, count / 2, least, last, visit);
+    }
+
+    std::size_t m_leaves;
+    std::vector<double> m_tree; ///< each from 1 on is the higher one of 2 * i and 2 * i + 1
+};
+
+} // namespace
 
 /// The memos of a track where they stood when they were read, in the order of their starts.
 class PlacedMemos {
 public:
-    explicit PlacedMemos(const Track& track)
-    {
-        for (HostEvent& event : track.clipEvents()) {
-            const SecondsRange span{event.getStart(), event.getEnd()};
-            m_memos.push_back({std::move(event), span});
-        }
-        std::ranges::stable_sort(m_memos, {}, [](const PlacedMemo& memo) { return memo.span.start; });
-        double latest = std::numeric_limits<double>::lowest();
-        for (const PlacedMemo& memo : m_memos)
-            m_latestEnds.push_back(latest = std::max(latest, memo.span.end));
-    }
+    explicit PlacedMemos(const Track& track) : m_memos(read(track)), m_ends(endsOf(m_memos)) {}
 
     const std::vector<PlacedMemo>& all() const { return m_memos; }
-    /// Those that may have something in a range, and perhaps some before it.
-    std::span<const PlacedMemo> touching(const SecondsRange& range) const
+    /// Gives those that may have something in a range.
+    template <class Visit>
+    void visitTouching(const SecondsRange& range, const Visit& visit) const
     {
-        const auto first =
-            std::ranges::partition_point(m_latestEnds, [&range](double end) { return isBefore(end, range.start); });
         const auto last = std::ranges::partition_point(
             m_memos, [&range](const PlacedMemo& memo) { return isBefore(memo.span.start, range.end); });
-        const auto from = m_memos.begin() + (first - m_latestEnds.begin());
-        return from < last ? std::span(from, last) : std::span<const PlacedMemo>();
+        m_ends.visit(range.start - core::SameInstant, static_cast<std::size_t>(last - m_memos.begin()),
+                     [&](std::size_t index) { visit(m_memos[index]); });
     }
 
 private:
+    static std::vector<PlacedMemo> read(const Track& track)
+    {
+        std::vector<PlacedMemo> memos;
+        for (HostEvent& event : track.clipEvents()) {
+            const SecondsRange span{event.getStart(), event.getEnd()};
+            const std::int64_t id = event.getUserId();
+            memos.push_back({std::move(event), span, id});
+        }
+        std::ranges::stable_sort(memos, {}, [](const PlacedMemo& memo) { return memo.span.start; });
+        return memos;
+    }
+    static Highest endsOf(const std::vector<PlacedMemo>& memos)
+    {
+        std::vector<double> ends;
+        for (const PlacedMemo& memo : memos)
+            ends.push_back(memo.span.end);
+        return Highest(ends);
+    }
+
     std::vector<PlacedMemo> m_memos;
-    std::vector<double> m_latestEnds; ///< of each memo and those before it
+    Highest m_ends;
 };
 
 namespace {
@@ -76,21 +143,145 @@ bool liesIn(const SecondsRange& memo, const SecondsRange& range)
     return countsAsIn(memo, range) && isBefore(memo.start, range.end);
 }
 
-bool hasId(const std::vector<HostEvent>& memos, std::int64_t id)
+std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
 {
-    return std::ranges::any_of(memos, [id](const HostEvent& memo) { return memo.getUserId() == id; });
+    std::set<std::int64_t> ids;
+    for (const PlacedMemo& memo : memos)
+        ids.insert(memo.id);
+    return ids;
 }
 
-/// Takes the memo of that id out of the list; an empty handle when there is none.
-HostEvent takeById(std::vector<HostEvent>& memos, std::int64_t id)
-{
-    const auto found = std::ranges::find_if(memos, [id](const HostEvent& memo) { return memo.getUserId() == id; });
-    if (found == memos.end())
-        return {};
-    const HostEvent memo = *found;
-    memos.erase(found);
-    return memo;
-}
+/// Memos in an order, from which those of an id are taken, the first one first.
+class MemosById {
+public:
+    explicit MemosById(std::vector<PlacedMemo> memos)
+    {
+        for (PlacedMemo& memo : memos) {
+            m_indexes.emplace(memo.id, m_memos.size());
+            m_memos.emplace_back(std::move(memo));
+        }
+    }
+
+    std::size_t size() const { return m_indexes.size(); }
+    /// Nothing when there is none.
+    std::optional<PlacedMemo> take(std::int64_t id)
+    {
+        const auto found = m_indexes.lower_bound({id, 0});
+        if (found == m_indexes.end() || found->first != id)
+            return std::nullopt;
+        std::optional<PlacedMemo> memo = std::exchange(m_memos[found->second], std::nullopt);
+        m_indexes.erase(found);
+        return memo;
+    }
+    /// Those that are left.
+    std::vector<PlacedMemo> rest() const
+    {
+        std::vector<PlacedMemo> memos;
+        for (const std::optional<PlacedMemo>& memo : m_memos) {
+            if (memo)
+                memos.push_back(*memo);
+        }
+        return memos;
+    }
+
+private:
+    std::vector<std::optional<PlacedMemo>> m_memos;
+    std::set<std::pair<std::int64_t, std::size_t>> m_indexes;
+};
+
+/// The new ids that are given to memos of a track one after the other.
+class NewIds {
+public:
+    explicit NewIds(const Track& memos) : m_memos(memos) {}
+
+    std::int64_t next()
+    {
+        if (m_last == std::numeric_limits<std::int64_t>::max())
+            throw util::Result::OutOfRange;
+        m_last = m_last ? *m_last + 1 : m_memos.nextUserId();
+        return *m_last;
+    }
+
+private:
+    const Track& m_memos;
+    std::optional<std::int64_t> m_last;
+};
+
+/// Where a memo belongs among stretches that don't overlap.
+class Places {
+public:
+    /// The stretches are given in the order in which they are preferred.
+    explicit Places(const std::vector<SecondsRange>& stretches)
+        : m_order(sorted(stretches)), m_stretches(stretches), m_preference(preferences(m_order))
+    {
+    }
+
+    struct Belongs {
+        std::optional<std::size_t> inside;  ///< the first stretch in which most of it lies
+        std::optional<std::size_t> touched; ///< the first into which it reaches
+    };
+    Belongs find(const SecondsRange& memo) const
+    {
+        const auto first = static_cast<std::size_t>(
+            std::ranges::partition_point(m_order,
+                                         [&](std::size_t at) { return isBefore(m_stretches[at].end, memo.start); }) -
+            m_order.begin());
+        const auto last = static_cast<std::size_t>(
+            std::ranges::partition_point(m_order,
+                                         [&](std::size_t at) { return !isBefore(memo.end, m_stretches[at].start); }) -
+            m_order.begin());
+        Belongs found;
+        // Between those at its ends, it sticks out of each on both sides.
+        constexpr std::size_t Ends = 3;
+        const std::size_t middle = std::min(first + Ends, last);
+        const std::size_t middleEnd = std::max(middle, last - std::min(last, Ends));
+        for (std::size_t index = first; index < middle; ++index)
+            look(memo, index, found);
+        for (std::size_t index = middleEnd; index < last; ++index)
+            look(memo, index, found);
+        prefer(found.touched, m_preference.among(middle, middleEnd));
+        const auto from = [this](std::size_t index) { return m_order.begin() + static_cast<std::ptrdiff_t>(index); };
+        const auto most = std::partition_point(from(middle), from(middleEnd),
+                                               [&](std::size_t at) { return !liesIn(memo, m_stretches[at]); });
+        prefer(found.inside, m_preference.among(static_cast<std::size_t>(most - m_order.begin()), middleEnd));
+        return found;
+    }
+
+private:
+    static std::vector<std::size_t> sorted(const std::vector<SecondsRange>& stretches)
+    {
+        std::vector<std::size_t> order(stretches.size());
+        std::iota(order.begin(), order.end(), std::size_t{0});
+        std::ranges::sort(order, {}, [&](std::size_t at) { return stretches[at].start; });
+        return order;
+    }
+    static Highest preferences(const std::vector<std::size_t>& order)
+    {
+        std::vector<double> preferences;
+        for (const std::size_t at : order)
+            preferences.push_back(-static_cast<double>(at));
+        return Highest(preferences);
+    }
+    static void prefer(std::optional<std::size_t>& found, double preference)
+    {
+        if (preference == Highest::None)
+            return;
+        const auto at = static_cast<std::size_t>(-preference);
+        found = std::min(found.value_or(at), at);
+    }
+    void look(const SecondsRange& memo, std::size_t index, Belongs& found) const
+    {
+        const std::size_t at = m_order[index];
+        if (liesIn(memo, m_stretches[at]))
+            found.inside = std::min(found.inside.value_or(at), at);
+        if (reachesInto(memo, m_stretches[at]))
+            found.touched = std::min(found.touched.value_or(at), at);
+    }
+
+    std::vector<std::size_t> m_order; ///< by their starts
+    const std::vector<SecondsRange>& m_stretches;
+    Highest m_preference;
+};
 
 } // namespace
 
@@ -124,7 +315,10 @@ std::vector<MemoSync::Shown> MemoSync::stretchesOf(const Previewed& previewed)
                                  event.dstOut().toSeconds(framerate) + offset};
         const double srcIn = event.srcIn().toSeconds(framerate) + moved;
         const double srcOut = event.srcOut().toSeconds(framerate) + moved;
-        const std::vector<SecondsRange> pieces = later.add(whole);
+        const SecondsRange written{std::max(whole.start, previewed.begin + previewed.offset), whole.end};
+        if (isEmpty(written))
+            continue;
+        const std::vector<SecondsRange> pieces = later.add(written);
         for (auto piece = pieces.rbegin(); piece != pieces.rend(); ++piece) {
             const SecondsRange source{srcIn + (piece->start - whole.start),
                                       std::min(srcIn + (piece->end - whole.start), srcOut)};
@@ -141,63 +335,224 @@ MemoSync::Memo MemoSync::memoOf(const HostEvent& event)
     return {event.getUserId(), event.getName(), event.getStart(), event.getEnd()};
 }
 
-const MemoSync::Memo* MemoSync::findById(const Memos& memos, std::int64_t id)
+void MemoSync::Remembered::add(Memo memo)
 {
-    const auto found = std::ranges::find(memos, id, &Memo::id);
-    return found != memos.end() ? &*found : nullptr;
+    byId.emplace(memo.id, memo);
+    copies.insert(std::move(memo));
+}
+
+const MemoSync::Memo* MemoSync::Remembered::find(std::int64_t id) const
+{
+    const auto found = byId.find(id);
+    return found != byId.end() ? &found->second : nullptr;
 }
 
 MemoSync::Preview MemoSync::previewOf(const PlacedMemos& memos, const Previewed& previewed)
 {
     Preview preview{stretchesOf(previewed), {}};
-    // They don't overlap.
-    std::vector<Shown*> inOrder;
-    for (Shown& shown : preview.shown)
-        inOrder.push_back(&shown);
-    std::ranges::sort(inOrder, {}, [](const Shown* shown) { return shown->stretch.preview.start; });
+    std::vector<SecondsRange> stretches;
+    for (const Shown& shown : preview.shown)
+        stretches.push_back(shown.stretch.preview);
+    const Places places(stretches);
 
     const double offset = previewed.offset + previewed.moved;
-    std::vector<std::pair<Shown*, HostEvent>> reaching;
+    std::vector<std::pair<Shown*, PlacedMemo>> reaching;
     for (const PlacedMemo& memo : memos.all()) {
         if (isBefore(memo.span.end, offset))
             continue;
-        Shown* inside = nullptr;
-        Shown* touched = nullptr;
-        const auto first = std::ranges::partition_point(
-            inOrder, [&](const Shown* shown) { return isBefore(shown->stretch.preview.end, memo.span.start); });
-        for (auto next = first; next != inOrder.end() && !isBefore(memo.span.end, (*next)->stretch.preview.start);
-             ++next) {
-            const SecondsRange& stretch = (*next)->stretch.preview;
-            if (liesIn(memo.span, stretch) && (!inside || *next < inside))
-                inside = *next;
-            if (reachesInto(memo.span, stretch) && (!touched || *next < touched))
-                touched = *next;
-        }
+        const auto [inside, touched] = places.find(memo.span);
         if (inside)
-            inside->copies.push_back(memo.event);
+            preview.shown[*inside].copies.push_back(memo);
         else if (touched)
-            reaching.emplace_back(touched, memo.event);
+            reaching.emplace_back(&preview.shown[*touched], memo);
         else
-            preview.adrift.push_back(memo.event);
+            preview.adrift.push_back(memo);
     }
     for (const auto& [shown, memo] : reaching)
         shown->copies.push_back(memo);
     return preview;
 }
 
+/// What the memos do when the user has edited their copies.
+class MemoSync::Following {
+public:
+    Following(IHostContext* context, const Track& memos, const Preview& preview, IEditTransaction& transaction)
+        : m_hostContext(context), m_memos(memos), m_preview(preview), m_adrift(idsOf(preview.adrift)),
+          m_transaction(transaction), m_newIds(memos)
+    {
+    }
+
+    /// The memos have stood as placed. What the copies were like is null where that isn't known.
+    void follow(PlacedMemos placed, const std::function<const Remembered*(const Shown&)>& rememberedOf)
+    {
+        for (const Shown& shown : m_preview.shown) {
+            if (hasChanged(shown.stretch.source)) {
+                placed = PlacedMemos(m_memos);
+                m_changed = CoveredRanges();
+            }
+            followStretch(placed, shown, rememberedOf(shown));
+        }
+    }
+
+private:
+    /// The memos of those adrift stay.
+    void followStretch(const PlacedMemos& placed, const Shown& shown, const Remembered* remembered)
+    {
+        const Stretch& stretch = shown.stretch;
+        std::vector<PlacedMemo> copies = shown.copies;
+        MemosById sources(sourcesOf(placed, stretch, copies));
+        if (remembered)
+            keepEdited(copies, sources, *remembered);
+        const std::size_t copyCount = copies.size();
+        const std::size_t sourceCount = sources.size();
+
+        std::erase_if(copies, [&](const PlacedMemo& copy) {
+            std::optional<PlacedMemo> memo = sources.take(copy.id);
+            if (memo)
+                carryOver(copy.event, *memo, stretch, remembered ? remembered->find(memo->id) : nullptr);
+            return memo.has_value();
+        });
+        // What is left has no partner. As long as nothing is known of what the user has done, the numbers tell whether he
+        // has removed or written something.
+        if (remembered || sourceCount > copyCount) {
+            for (PlacedMemo& memo : sources.rest()) {
+                if (m_adrift.contains(memo.id))
+                    continue;
+                noteChange(memo.span);
+                memo.event.remove(m_transaction);
+            }
+        }
+        if (remembered || copyCount > sourceCount) {
+            for (const PlacedMemo& copy : copies)
+                writeMemoOf(copy, stretch);
+        }
+    }
+
+    /// The memos that a stretch shows.
+    static std::vector<PlacedMemo> sourcesOf(const PlacedMemos& memos, const Stretch& stretch,
+                                             const std::vector<PlacedMemo>& copies)
+    {
+        std::vector<PlacedMemo> found;
+        std::vector<PlacedMemo> reaching;
+        memos.visitTouching(stretch.source, [&](const PlacedMemo& memo) {
+            if (liesIn(memo.span, stretch.source))
+                found.push_back(memo);
+            else if (reachesInto(memo.span, stretch.source))
+                reaching.push_back(memo);
+        });
+        if (reaching.empty())
+            return found;
+        // A memo that only reaches into the stretch has its copy there, too.
+        const std::set<std::int64_t> copied = idsOf(copies);
+        std::set<std::int64_t> taken = idsOf(found);
+        for (PlacedMemo& memo : reaching) {
+            if (copied.contains(memo.id) && taken.insert(memo.id).second)
+                found.push_back(std::move(memo));
+        }
+        return found;
+    }
+
+    /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
+    static void keepEdited(std::vector<PlacedMemo>& copies, MemosById& sources, const Remembered& remembered)
+    {
+        // Another copy of the same memo may have been edited, or the memo itself.
+        std::erase_if(copies, [&](const PlacedMemo& copy) {
+            const bool isUntouched = remembered.copies.contains(memoOf(copy.event));
+            if (isUntouched)
+                sources.take(copy.id);
+            return isUntouched;
+        });
+        // What the user has written in the real programme meanwhile has no copy that he could have removed.
+        const std::set<std::int64_t> edited = idsOf(copies);
+        for (const PlacedMemo& memo : sources.rest()) {
+            if (!edited.contains(memo.id) && !remembered.find(memo.id))
+                sources.take(memo.id);
+        }
+    }
+
+    /// What the copy was like is null where that isn't known.
+    void carryOver(const HostEvent& copy, PlacedMemo& placed, const Stretch& stretch, const Memo* remembered)
+    {
+        HostEvent& memo = placed.event;
+        // The memo may have been edited itself, or by another copy.
+        const Memo edited = memoOf(copy);
+        const bool isRenamed = !remembered || edited.name != remembered->name;
+        if (isRenamed && memo.getName() != edited.name)
+            memo.setName(m_transaction, edited.name);
+        if (remembered && edited.start == remembered->start && edited.end == remembered->end)
+            return;
+
+        // What hangs over an edge of the stretch isn't in the preview, and stays.
+        const auto followed = [&stretch](double own, double inPreview) {
+            const double mapped = stretch.toSource(inPreview);
+            return std::abs(stretch.clamped(own) - mapped) < core::SameInstant ? own : mapped;
+        };
+        const auto [ownStart, ownEnd] = placed.span;
+        const double start = followed(ownStart, edited.start);
+        const double end = followed(ownEnd, edited.end);
+        if (start == ownStart && (!memo.isRange() || end == ownEnd))
+            return;
+        noteChange(placed.span);
+        memo.setStart(m_transaction, start);
+        if (memo.isRange())
+            memo.setLength(m_transaction, end - start);
+        noteChange({start, std::max(start, memo.getEnd())});
+    }
+
+    void writeMemoOf(const PlacedMemo& written, const Stretch& stretch)
+    {
+        HostEvent copy = written.event;
+        copy.setUserId(m_newIds.next());
+        const SecondsRange span{stretch.toSource(copy.getStart()), stretch.toSource(copy.getEnd())};
+        noteChange(span);
+        Marker{span.start, span.end, copy.getName(), {}, copy.getUserId()}.insertInto(m_hostContext, m_transaction,
+                                                                                      m_memos);
+    }
+
+    /// Notes that a memo isn't there any more, or is from now on.
+    void noteChange(const SecondsRange& span)
+    {
+        m_changed.add({span.start - 2.0 * core::SameInstant, span.end + 2.0 * core::SameInstant});
+    }
+    bool hasChanged(const SecondsRange& stretch) const
+    {
+        const SecondsRange around{stretch.start - core::SameInstant, stretch.end + core::SameInstant};
+        const std::vector<SecondsRange> unchanged = m_changed.uncovered(around);
+        return unchanged.size() != 1 || unchanged.front() != around;
+    }
+
+    IHostContext* m_hostContext;
+    const Track& m_memos;
+    const Preview& m_preview;
+    std::set<std::int64_t> m_adrift;
+    IEditTransaction& m_transaction;
+    NewIds m_newIds;
+    CoveredRanges m_changed; ///< since the memos were placed
+};
+
 void MemoSync::remember(const Track& memos, const Previewed& previewed)
 {
     // After a failure nothing is known. What is known in part would look as if the user had written the rest.
     m_remembered.clear();
-    std::map<std::shared_ptr<core::EventBase>, Memos> found;
+    std::map<std::shared_ptr<core::EventBase>, Remembered> found;
     for (const auto& event : previewed.events)
         found.try_emplace(event);
     const PlacedMemos placed(memos);
     if (!placed.all().empty()) {
-        for (const Shown& shown : previewOf(placed, previewed).shown)
-            std::ranges::transform(shown.copies, std::back_inserter(found[shown.event]), memoOf);
+        for (const Shown& shown : previewOf(placed, previewed).shown) {
+            for (const PlacedMemo& copy : shown.copies)
+                found[shown.event].add(memoOf(copy.event));
+        }
     }
     m_remembered = std::move(found);
+}
+
+std::vector<HostEvent> MemoSync::adrift(const Track& memos, const Previewed& previewed)
+{
+    std::vector<HostEvent> events;
+    for (const PlacedMemo& memo : previewOf(PlacedMemos(memos), previewed).adrift)
+        events.push_back(memo.event);
+    return events;
 }
 
 void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTransaction& transaction)
@@ -206,115 +561,10 @@ void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTrans
     if (placed.all().empty())
         return;
     const Preview preview = previewOf(placed, previewed);
-    for (const Shown& shown : preview.shown) {
+    Following(m_hostContext, memos, preview, transaction).follow(std::move(placed), [this](const Shown& shown) {
         const auto remembered = m_remembered.find(shown.event);
-        if (followStretch(placed, memos, transaction, shown, preview.adrift,
-                          remembered != m_remembered.end() ? &remembered->second : nullptr))
-            placed = PlacedMemos(memos);
-    }
-}
-
-bool MemoSync::followStretch(const PlacedMemos& placed, const Track& memos, IEditTransaction& transaction,
-                             const Shown& shown, const std::vector<HostEvent>& adrift, const Memos* remembered)
-{
-    const Stretch& stretch = shown.stretch;
-    std::vector<HostEvent> copies = shown.copies;
-    std::vector<HostEvent> sources = sourcesOf(placed, stretch, copies);
-    if (remembered)
-        keepEdited(copies, sources, *remembered);
-    if (copies.empty() && sources.empty())
-        return false;
-    const std::size_t copyCount = copies.size();
-    const std::size_t sourceCount = sources.size();
-
-    std::erase_if(copies, [&](const HostEvent& copy) {
-        HostEvent memo = takeById(sources, copy.getUserId());
-        if (memo)
-            carryOver(transaction, copy, memo, stretch, remembered ? findById(*remembered, memo.getUserId()) : nullptr);
-        return static_cast<bool>(memo);
+        return remembered != m_remembered.end() ? &remembered->second : nullptr;
     });
-    std::erase_if(sources, [&](const HostEvent& memo) { return hasId(adrift, memo.getUserId()); });
-    // What is left has no partner. As long as nothing is known of what the user has done, the numbers tell whether he has
-    // removed or written something.
-    if (remembered || sourceCount > copyCount) {
-        for (HostEvent& memo : sources)
-            memo.remove(transaction);
-    }
-    if (remembered || copyCount > sourceCount) {
-        for (HostEvent& copy : copies) {
-            copy.setUserId(memos.nextUserId());
-            Marker{stretch.toSource(copy.getStart()),
-                   stretch.toSource(copy.getEnd()),
-                   copy.getName(),
-                   {},
-                   copy.getUserId()}
-                .insertInto(m_hostContext, transaction, memos);
-        }
-    }
-    return true;
-}
-
-std::vector<HostEvent> MemoSync::sourcesOf(const PlacedMemos& memos, const Stretch& stretch,
-                                           const std::vector<HostEvent>& copies)
-{
-    std::vector<HostEvent> found;
-    std::vector<HostEvent> reaching;
-    for (const PlacedMemo& memo : memos.touching(stretch.source)) {
-        if (liesIn(memo.span, stretch.source))
-            found.push_back(memo.event);
-        else if (reachesInto(memo.span, stretch.source))
-            reaching.push_back(memo.event);
-    }
-    // A memo that only reaches into the stretch has its copy there, too.
-    for (HostEvent& memo : reaching) {
-        const std::int64_t id = memo.getUserId();
-        if (hasId(copies, id) && !hasId(found, id))
-            found.push_back(std::move(memo));
-    }
-    return found;
-}
-
-void MemoSync::keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered)
-{
-    // Another copy of the same memo may have been edited, or the memo itself.
-    std::erase_if(copies, [&](const HostEvent& copy) {
-        const bool isUntouched = std::ranges::find(remembered, memoOf(copy)) != remembered.end();
-        if (isUntouched)
-            takeById(sources, copy.getUserId());
-        return isUntouched;
-    });
-    // What the user has written in the real programme meanwhile has no copy that he could have removed.
-    std::erase_if(sources, [&](const HostEvent& memo) {
-        const std::int64_t id = memo.getUserId();
-        return !hasId(copies, id) && !findById(remembered, id);
-    });
-}
-
-void MemoSync::carryOver(IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo, const Stretch& stretch,
-                         const Memo* remembered)
-{
-    // The memo may have been edited itself, or by another copy.
-    const Memo edited = memoOf(copy);
-    const bool isRenamed = !remembered || edited.name != remembered->name;
-    if (isRenamed && memo.getName() != edited.name)
-        memo.setName(transaction, edited.name);
-    if (remembered && edited.start == remembered->start && edited.end == remembered->end)
-        return;
-
-    // What hangs over an edge of the stretch isn't in the preview, and stays.
-    const auto followed = [&stretch](double own, double inPreview) {
-        const double mapped = stretch.toSource(inPreview);
-        return std::abs(stretch.clamped(own) - mapped) < core::SameInstant ? own : mapped;
-    };
-    const double ownStart = memo.getStart();
-    const double ownEnd = memo.getEnd();
-    const double start = followed(ownStart, edited.start);
-    const double end = followed(ownEnd, edited.end);
-    if (start != ownStart || (memo.isRange() && end != ownEnd)) {
-        memo.setStart(transaction, start);
-        if (memo.isRange())
-            memo.setLength(transaction, end - start);
-    }
 }
 
 } // namespace cadrel::host

@@ -9,6 +9,7 @@
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -24,6 +25,7 @@ class EventBase;
 namespace cadrel::host {
 
 class PlacedMemos;
+struct PlacedMemo;
 class Track;
 
 /// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
@@ -38,6 +40,7 @@ public:
         const Events& events;
         core::Framerate framerate; ///< of their timecodes
         double offset;             ///< how much later than its destination each one stands, in seconds
+        double begin;              ///< of the host's timeline, before which nothing stands, on the project's clock
         double moved = 0.0;        ///< how far the time origin has moved since they were written, in seconds
     };
 
@@ -50,6 +53,8 @@ public:
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.
     void remember(const Track& memos, const Previewed& previewed);
     void forget() { m_remembered.clear(); }
+    /// The memos after the preview offset that stand in no stretch of the preview, and so have no part in what is followed.
+    static std::vector<HostEvent> adrift(const Track& memos, const Previewed& previewed);
 
 private:
     /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's
@@ -67,41 +72,37 @@ private:
         double start;
         double end;
 
-        bool operator==(const Memo&) const = default;
+        auto operator<=>(const Memo&) const = default;
     };
-    using Memos = std::vector<Memo>;
+    /// The copies of a previewed event as they were.
+    struct Remembered {
+        std::set<Memo> copies;
+        std::map<std::int64_t, Memo> byId; ///< the first of each id
+
+        void add(Memo memo);
+        /// Null when there is none.
+        const Memo* find(std::int64_t id) const;
+    };
     /// A stretch with the copies that belong to it.
     struct Shown {
         std::shared_ptr<core::EventBase> event;
         Stretch stretch;
-        std::vector<HostEvent> copies;
+        std::vector<PlacedMemo> copies;
     };
     /// Each memo after the preview offset belongs to the first stretch in which most of it lies or, where there is
     /// none, to the first into which it reaches.
     struct Preview {
-        std::vector<Shown> shown;      ///< in the order of the events
-        std::vector<HostEvent> adrift; ///< in no stretch
+        std::vector<Shown> shown;       ///< in the order of the events
+        std::vector<PlacedMemo> adrift; ///< in no stretch
     };
+    class Following;
 
     static std::vector<Shown> stretchesOf(const Previewed& previewed);
     static Preview previewOf(const PlacedMemos& memos, const Previewed& previewed);
     static Memo memoOf(const HostEvent& event);
-    /// Null when there is none.
-    static const Memo* findById(const Memos& memos, std::int64_t id);
-    /// The memos of those adrift stay. Returns whether the user has edited a copy or, where that isn't known, may have.
-    bool followStretch(const PlacedMemos& placed, const Track& memos, Velmark::IEditTransaction& transaction,
-                       const Shown& shown, const std::vector<HostEvent>& adrift, const Memos* remembered);
-    /// The memos that a stretch shows.
-    static std::vector<HostEvent> sourcesOf(const PlacedMemos& memos, const Stretch& stretch,
-                                            const std::vector<HostEvent>& copies);
-    /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
-    static void keepEdited(std::vector<HostEvent>& copies, std::vector<HostEvent>& sources, const Memos& remembered);
-    /// What the copy was like is null where that isn't known.
-    static void carryOver(Velmark::IEditTransaction& transaction, const HostEvent& copy, HostEvent& memo,
-                          const Stretch& stretch, const Memo* remembered);
 
     Velmark::IHostContext* m_hostContext;
-    std::map<std::shared_ptr<core::EventBase>, Memos> m_remembered;
+    std::map<std::shared_ptr<core::EventBase>, Remembered> m_remembered;
 };
 
 } // namespace cadrel::host

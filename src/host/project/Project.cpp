@@ -267,7 +267,8 @@ void Project::onProjectEdited(IEditTransaction& transaction)
 MemoSync::Previewed Project::previewed()
 {
     const double start = requiredOffset() - timeOrigin();
-    return {m_previewEvents->events(), getFramerate(), requiredOffset(), writtenFrom().value_or(start) - start};
+    return {m_previewEvents->events(), getFramerate(), requiredOffset(), timeOrigin(),
+            writtenFrom().value_or(start) - start};
 }
 
 void Project::syncMemos(IEditTransaction& transaction)

@@ -170,9 +170,9 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
     for (const SourceGroup& group : groupsOf(cut)) {
-        // What comes along of a clip that hangs over may have no room at the begin of the clock. Before the preview stretch
-        // it would never be taken away.
-        const double missing = std::max(-group.destination, 0.0);
+        // There is no room before the begin of the host's timeline. What comes along of a clip that hangs over may reach
+        // there, and events may after the time origin has moved.
+        const double missing = std::max(timeOrigin() - group.destination, 0.0);
         const double start = group.source.start + missing;
         if (isBefore(start, group.source.end))
             copyRange(group.tracks, start, group.source.end, group.destination + missing + offset);
@@ -309,12 +309,14 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
         track.removeRange(transaction, start, end);
         tick(1);
     }
+    const double origin = timeOrigin();
+    const double carried = std::max(start, origin);
+    if (isBefore(carried, end))
+        copyRange(pointersTo(tracks), carried + offset, end + offset, carried);
     // What is before the stretch belongs to the real programme, and an edge there would leave automation points in it.
     const double written = std::max(start, 0.0);
     if (!isBefore(written, end))
         return;
-    copyRange(pointersTo(tracks), written + offset, end + offset, written);
-    const double origin = timeOrigin();
     for (const Track& track : tracks)
         removePoints(transaction, track, {written + offset - origin, end + offset - origin});
     deleteRange(transaction, written + offset, end + offset);

@@ -14,7 +14,6 @@
 #include <algorithm>
 #include <cstdint>
 #include <set>
-#include <string>
 #include <utility>
 
 using namespace Velmark;
@@ -136,6 +135,8 @@ void Project::clearPreview(IEditTransaction& transaction)
     }
     for (const Track& track : tracks)
         PreviewRecord::dropFrom(track);
+    // What is no longer in the preview stretch isn't followed any more either.
+    m_previewEvents->clear();
     m_lockedTracks.clear();
     m_indexes.clear();
 }
@@ -157,21 +158,27 @@ std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRa
     if (const auto record = PreviewRecord::keptBy(track))
         events = record->others(std::move(events));
     findMarkerTracks();
-    if (track == markerTrack(TrackRole::Memos)) {
-        // What the user has made of the copy of a memo is in the memo itself, unless the copy stands where the new cut has
-        // nothing. There it may have a name of its own.
-        std::set<std::pair<std::int64_t, std::wstring>> memos;
-        for (const HostEvent& memo : track.clipEvents()) {
-            if (isBefore(memo.getStart(), stretch.start + timeOrigin()))
-                memos.emplace(memo.getUserId(), memo.getName());
-        }
-        std::erase_if(events, [&](const Node& event) {
-            const HostEvent copy(track, event);
-            const std::int64_t id = copy.getUserId();
-            return id > 0 && memos.contains({id, copy.getName()});
-        });
-    }
+    if (track == markerTrack(TrackRole::Memos))
+        leaveOutFollowed(events, track, stretch.start);
     return events;
+}
+
+void Project::leaveOutFollowed(std::vector<Node>& copies, const Track& memos, double start)
+{
+    if (copies.empty() || !hasPreviewOffset())
+        return;
+    std::set<std::int64_t> ids;
+    for (const HostEvent& memo : memos.clipEvents()) {
+        if (isBefore(memo.getStart(), start + timeOrigin()))
+            ids.insert(memo.getUserId());
+    }
+    std::set<const IProjectNode*> adrift;
+    for (const HostEvent& memo : MemoSync::adrift(memos, previewed()))
+        adrift.insert(memo.node());
+    std::erase_if(copies, [&](const Node& event) {
+        const std::int64_t id = HostEvent(memos, event).getUserId();
+        return id > 0 && ids.contains(id) && !adrift.contains(event.get());
+    });
 }
 
 void Project::findPreviewedTracks()

@@ -4,19 +4,35 @@
 
 #include "core/model/VideoList.h"
 #include "host/border/HostFailure.h"
+#include "host/border/NodeReading.h"
 #include "host/project/MediaPool.h"
 #include "host/track/HostEvent.h"
+#include "host/track/Instant.h"
 #include "host/video/PoolVideoSource.h"
 #include "host/video/VideoTrackHandler.h"
 #include "velmark/ClassId.h"
 #include "velmark/Context.h"
 #include "velmark/Editing.h"
+#include "velmark/Project.h"
 
+#include <algorithm>
 #include <limits>
 
 using namespace Velmark;
 
 namespace cadrel::host {
+
+namespace {
+
+Counted<IProjectDocument> documentOf(const Track& track)
+{
+    auto node = required(query<IProjectNode>(track.node()));
+    while (IProjectNode* const parent = node->getParent())
+        node = Counted<IProjectNode>::share(parent);
+    return required(query<IProjectDocument>(node));
+}
+
+} // namespace
 
 VideoSourceTrack::VideoSourceTrack(IHostContext* context, PoolVideoSource& source, VideoTrackHandler& handler,
                                    std::int32_t mode)
@@ -42,15 +58,45 @@ bool VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
     MediaPool* const pool = m_source.mediaPool();
     if (!pool)
         return true;
+    const double origin = m_track.timeOrigin();
     for (const core::VideoList::Entry& entry : list->entries()) {
-        HostEvent event(m_track, required(create<IProjectNode>(m_hostContext, ClassId::ClipEvent)));
         const double start = m_offset + entry.start.toSeconds();
-        event.setStart(transaction, start);
-        event.setEnd(transaction, start + entry.length.toSeconds());
+        const double length = entry.length.toSeconds();
+        const double missing = isBefore(start, origin) ? origin - start : 0.0;
+        if (missing > 0.0 && !isBefore(missing, length))
+            continue;
+        HostEvent event(m_track, required(create<IProjectNode>(m_hostContext, ClassId::ClipEvent)));
+        const double possible = std::max(start, origin);
+        event.setStart(transaction, possible);
+        event.setEnd(transaction, possible + length);
         event.setClip(pool->findClip(entry).get(), 0);
-        requireOk(transaction.insert(m_track.container().get(), event.node()));
+        if (missing > 0.0)
+            insertWithoutStart(transaction, *event.node(), missing);
+        else
+            requireOk(transaction.insert(m_track.container().get(), event.node()));
     }
     return true;
+}
+
+//     the list              |------ picture -----|
+//     time origin               |
+//     on a track of its own     |------ picture -----|
+//     written                   |-- picture -----|
+void VideoSourceTrack::insertWithoutStart(IEditTransaction& transaction, IProjectNode& event, double missing)
+{
+    const double length = event.getEnd(nullptr);
+    const auto document = documentOf(m_track);
+    const auto root = required(Counted<FUnknown>::adopt(document->getContainer(nullptr)));
+    const auto track = required(Counted<FUnknown>::adopt(document->createTrack(TypeWord::Video)));
+    requireOk(transaction.insert(root.get(), track.get()));
+    requireOk(transaction.insert(track.get(), &event));
+    const auto list = required(create<IObjectList>(m_hostContext));
+    requireOk(list->add(track.get(), 0));
+    requireOk(
+        required(service<IEditService>(m_hostContext))->copyRange(document.get(), list.get(), 0, missing, length, 0.0));
+    const auto pieces = childrenOf(*required(query<IProjectNode>(track)));
+    requireOk(transaction.move(track.get(), m_track.container().get(), required(pieces.front().get())));
+    requireOk(transaction.remove(root.get(), track.get()));
 }
 
 void VideoSourceTrack::clear(IEditTransaction& transaction)

@@ -10,6 +10,7 @@
 namespace Velmark {
 class IEditTransaction;
 class IHostContext;
+class IProjectNode;
 } // namespace Velmark
 
 namespace cadrel::host {
@@ -31,13 +32,16 @@ public:
     void setOffset(double seconds) { m_offset = seconds; }
     /// Replaces what stands on the track by the videos of the list; does nothing for an empty one, nor on a track on which
     /// the user has put another video. With an offset only what starts there or later is replaced, because the real
-    /// programme isn't written. False when there are videos and the user has locked the track, which stays as it is then.
+    /// programme isn't written. What would lie before the time origin is left out. False when there are videos and the user has locked the track, which stays as it is then.
     bool writeVideoEvents(Velmark::IEditTransaction& transaction);
 
     void tracksChanged() override;
 
 private:
     void clear(Velmark::IEditTransaction& transaction);
+    /// Inserts an event, which stands at the time origin, without so many seconds at its start. The host cuts it on a track
+    /// of its own, so that nothing else changes.
+    void insertWithoutStart(Velmark::IEditTransaction& transaction, Velmark::IProjectNode& event, double missing);
 
     Velmark::IHostContext* m_hostContext;
     PoolVideoSource& m_source;

@@ -796,6 +796,29 @@ TEST_P(MemoSyncTest, BehindTheMaterialOfASlowerEventAMemoStandsAtItsEnd)
     EXPECT_EQ(film(), Content{"late 20"});
 }
 
+TEST_P(MemoSyncTest, OfAnEventThatReachesToBeforeTheTimelineWhatIsShownIsFollowed)
+{
+    if (GetParam() == 0.0)
+        return; // There is no timecode before it.
+    addMemo(u"cue", 12.0);
+    addMemo(u"splash", 18.0);
+    const auto beforeTheClock = event("01:00:10:00", "01:00:20:00", "00:59:55:00", "01:00:05:00");
+    preview({event("01:00:40:00", "01:00:50:00", "00:59:40:00", "00:59:50:00"), beforeTheClock});
+    ASSERT_EQ(copies(), Content{"splash 3"});
+
+    move(copyOf(u"splash"), 2.0);
+    EXPECT_EQ(film(), (Content{"cue 12", "splash 17"}));
+    addCopy(u"gunshot", 1.0);
+    EXPECT_EQ(film(), (Content{"cue 12", "gunshot 16", "splash 17"}));
+
+    // Where nothing is known of the copies, their number tells.
+    host.adapter.model().setPreviewActive(false);
+    host.adapter.onProjectChanged();
+    host.adapter.model().setPreviewActive(true);
+    rename(copyOf(u"splash"), u"big splash");
+    EXPECT_EQ(film(), (Content{"cue 12", "gunshot 16", "big splash 17"}));
+}
+
 TEST_P(MemoSyncTest, EventsThatWriteNothingArePassedOver)
 {
     addMemo(u"cue", 12.0);
@@ -860,6 +883,140 @@ TEST(MemoSync, IsNotQuadraticInThePreviewedEvents)
 
         EXPECT_LT(many, 8.0 * few);
     }
+}
+
+TEST(MemoSync, IsNotQuadraticInStretchesAndMemosUnderAMemoThatSpansThemAll)
+{
+    const auto secondsToFollow = [](int count) {
+        PreviewedMemos previewed(0.0);
+        const core::Timecode begin(1, 0, 0, 0);
+        const double length = count / 25.0;
+        previewed.host.edit(u"Memos", [&] {
+            previewed.addMemo(u"reel", -1.0, length + 1.0);
+            previewed.addCopy(u"copy of the reel", 0.0, length);
+            for (int frame = 0; frame < count; ++frame)
+                previewed.addMemo(u"cue", frame / 25.0);
+        });
+        for (int frame = 0; frame < count; ++frame) {
+            auto event = std::make_shared<core::EventBase>();
+            const core::Timecode in(begin.toFrameCount() + frame);
+            const core::Timecode out(begin.toFrameCount() + frame + 1);
+            event->setTimecodes(in, out, in, out);
+            previewed.host.adapter.previewEvents().add(std::move(event));
+        }
+        previewed.host.adapter.model().setPreviewActive(true);
+        return secondsOf([&] {
+            previewed.host.adapter.onProjectChanged();
+            previewed.addCopy(u"note", 0.5);
+        });
+    };
+    secondsToFollow(1000);
+
+    const double few = std::max(secondsToFollow(3000), secondsToFollow(3000));
+    const double many = std::min(secondsToFollow(12000), secondsToFollow(12000));
+
+    EXPECT_LT(many, 8.0 * few);
+}
+
+TEST(MemoSync, IsNotQuadraticInCopiesThatSpanTheStretches)
+{
+    const auto secondsToFollow = [](int count) {
+        PreviewedMemos previewed(0.0);
+        const core::Timecode begin(1, 0, 0, 0);
+        previewed.host.edit(u"Memos", [&] {
+            for (int index = 0; index < count; ++index)
+                previewed.addCopy(u"copy", index % 7, count / 25.0 - index % 5);
+        });
+        for (int frame = 0; frame < count; ++frame) {
+            auto event = std::make_shared<core::EventBase>();
+            const core::Timecode in(begin.toFrameCount() + frame);
+            const core::Timecode out(begin.toFrameCount() + frame + 1);
+            event->setTimecodes(in, out, in, out);
+            previewed.host.adapter.previewEvents().add(std::move(event));
+        }
+        previewed.host.adapter.model().setPreviewActive(true);
+        return secondsOf([&] { previewed.host.adapter.onProjectChanged(); });
+    };
+    secondsToFollow(1000);
+
+    const double few = std::max(secondsToFollow(2000), secondsToFollow(2000));
+    const double many = std::min(secondsToFollow(8000), secondsToFollow(8000));
+
+    EXPECT_LT(many, 8.0 * few);
+}
+
+TEST(MemoSync, IsNotQuadraticInTheMemosOfOneStretch)
+{
+    const auto secondsToFollow = [](int count) {
+        PreviewedMemos previewed(0.0);
+        previewed.host.edit(u"Memos", [&] {
+            for (int index = 0; index < count; ++index)
+                previewed.addMemo(u"cue", 10.0 + 8.0 * index / count);
+        });
+        previewed.preview({PreviewedMemos::tenSeconds()});
+        const auto all = childrenOf(*previewed.memos);
+        EXPECT_EQ(all.size(), static_cast<std::size_t>(2 * count));
+        const double seconds = secondsOf([&] {
+            previewed.host.edit(u"Move", [&] {
+                for (int index = count; index < 2 * count; ++index) {
+                    const auto& copy = all[static_cast<std::size_t>(index)];
+                    copy->setStart(nullptr, 0, copy->getStart(nullptr) + 1.0);
+                }
+            });
+            previewed.host.edit(u"Write", [&] {
+                for (int index = 0; index < count; ++index)
+                    previewed.addCopy(u"note", 30.0 + 9.0 * index / count);
+            });
+            previewed.host.edit(u"Remove", [&] {
+                for (int index = count; index < 2 * count; ++index)
+                    previewed.host.transaction()->remove(previewed.host.root(),
+                                                         all[static_cast<std::size_t>(index)].get());
+            });
+        });
+        EXPECT_EQ(childrenOf(*previewed.memos).size(), static_cast<std::size_t>(2 * count));
+        return seconds;
+    };
+    secondsToFollow(500);
+
+    const double few = std::max(secondsToFollow(1500), secondsToFollow(1500));
+    const double many = std::min(secondsToFollow(6000), secondsToFollow(6000));
+
+    EXPECT_LT(many, 8.0 * few);
+}
+
+TEST(MemoSync, IsNotQuadraticInEventsOfWhichEachIsEdited)
+{
+    const auto secondsToFollow = [](int count) {
+        PreviewedMemos previewed(0.0);
+        const core::Timecode begin(1, 0, 0, 0);
+        std::vector<std::shared_ptr<core::EventBase>> events;
+        previewed.host.edit(u"Memos", [&] {
+            for (int index = 0; index < count; ++index)
+                previewed.addMemo(u"cue", index + 0.4);
+        });
+        for (int index = 0; index < count; ++index) {
+            auto event = std::make_shared<core::EventBase>();
+            const core::Timecode in(begin.toFrameCount() + index * 25);
+            const core::Timecode out(begin.toFrameCount() + index * 25 + 25);
+            event->setTimecodes(in, out, in, out);
+            events.push_back(std::move(event));
+        }
+        previewed.preview(events);
+        const auto all = childrenOf(*previewed.memos);
+        EXPECT_EQ(all.size(), static_cast<std::size_t>(2 * count));
+        return secondsOf([&] {
+            previewed.host.edit(u"Rename", [&] {
+                for (int index = count; index < 2 * count; ++index)
+                    all[static_cast<std::size_t>(index)]->setName(nullptr, text(u"gunshot").get(), 0);
+            });
+        });
+    };
+    secondsToFollow(200);
+
+    const double few = std::max(secondsToFollow(500), secondsToFollow(500));
+    const double many = std::min(secondsToFollow(2000), secondsToFollow(2000));
+
+    EXPECT_LT(many, 8.0 * few);
 }
 
 /// Memos and previewed events in tens of seconds, at random; the events share neither sources nor destinations. The user

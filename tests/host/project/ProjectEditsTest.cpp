@@ -668,7 +668,7 @@ TEST_P(ProjectEditsTest, ARestrictedRunMayBeginBeforeTheClock)
     EXPECT_EQ(contentOf(fx), (Content{"new 7-20", "behind 20-30"}));
 }
 
-TEST_P(ProjectEditsTest, ARestrictedRunReadsNothingThatStandsBeforeThePreview)
+TEST_P(ProjectEditsTest, ARestrictedRunReadsNothingBeforeThePreviewAndWritesNothingBeforeTheTimeline)
 {
     AlteredContext altered(host.context());
     const auto edits = makeCounted<EditRecorder>();
@@ -681,9 +681,9 @@ TEST_P(ProjectEditsTest, ARestrictedRunReadsNothingThatStandsBeforeThePreview)
     host.edit(u"Edit", [&] { project.completeApply(*host.transaction()); });
 
     ASSERT_EQ(edits->copies.size(), 1U);
-    EXPECT_EQ(edits->copies[0].start, Day - host.origin);
+    EXPECT_EQ(edits->copies[0].start, Day);
     EXPECT_EQ(edits->copies[0].end, Day + film(20.0));
-    EXPECT_EQ(edits->copies[0].destination, -host.origin);
+    EXPECT_EQ(edits->copies[0].destination, 0.0);
 }
 
 TEST_P(ProjectEditsTest, AnEmptyRangeReplacesNothing)

@@ -275,13 +275,41 @@ TEST_P(VideoSourceTrackTest, ReportsWhatTheHostRefuses)
     EXPECT_TRUE(written(newTrack).empty());
 }
 
-TEST_P(VideoSourceTrackTest, ReportsAVideoThatWouldStandBeforeTheBeginningOfTheProject)
+TEST_P(VideoSourceTrackTest, WritesOfAVideoWhatDoesNotLieBeforeTheBeginningOfTheProject)
 {
-    writer.setOffset(-11.0);
+    // The one stands from 10 s to 14 s, the other from 14 s to 16 s.
+    struct Case {
+        double offset;
+        std::vector<Written> written;
+        double firstPlaysFrom;
+    };
+    for (const Case& at :
+         {Case{-10.0, {{0.0, 4.0, &reel3}, {4.0, 6.0, &reel4}}, 0.0},
+          Case{-10.04, {{0.0, 3.96, &reel3}, {3.96, 5.96, &reel4}}, 0.04},
+          Case{-13.96, {{0.0, 0.04, &reel3}, {0.04, 2.04, &reel4}}, 3.96}, Case{-14.0, {{0.0, 2.0, &reel4}}, 0.0},
+          Case{-15.5, {{0.0, 0.5, &reel4}}, 1.5}, Case{-16.0, {}, 0.0}, Case{-20.0, {}, 0.0}}) {
+        SCOPED_TRACE(at.offset);
+        writer.setOffset(at.offset);
+        const std::string before = host.dump();
 
-    host.edit(u"Write", [&] {
-        EXPECT_EQ(resultOf([&] { writer.writeVideoEvents(*host.transaction()); }), Result::HostCallFailed);
-    });
+        EXPECT_TRUE(write());
+
+        const std::vector<Written> found = written(newTrack);
+        ASSERT_EQ(found.size(), at.written.size());
+        for (std::size_t index = 0; index < found.size(); ++index) {
+            EXPECT_NEAR(found[index].start, at.written[index].start, 1e-9);
+            EXPECT_NEAR(found[index].end, at.written[index].end, 1e-9);
+            EXPECT_EQ(found[index].clip, at.written[index].clip);
+            EXPECT_NEAR(standin::tests::childrenOf(*newTrack)[index]->getSourceOffset(nullptr),
+                        index == 0 ? at.firstPlaysFrom : 0.0, 1e-9);
+        }
+        EXPECT_TRUE(written(oldTrack).empty());
+        EXPECT_EQ(standin::tests::childrenOf(*host.root()).size(), 2U);
+        if (host.dump() != before) {
+            ASSERT_TRUE(host.undo());
+        }
+        EXPECT_EQ(host.dump(), before);
+    }
 }
 
 TEST_P(VideoSourceTrackTest, MissesEventsWhereTheHostMakesNone)

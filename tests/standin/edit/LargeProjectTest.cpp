@@ -89,6 +89,60 @@ private:
     Counted<IObjectList> tracks = create<IObjectList>(context());
 };
 
+/// So many copies of one clip of two seconds at one place, on the track or in a part of it.
+class StackedCopies : public TestHost {
+public:
+    StackedCopies(int count, bool areInAPart) : m_areInAPart(areInAPart)
+    {
+        m_list->add(m_track.get(), 0);
+        edit(u"Fill", [&] {
+            const auto holder = areInAPart ? addPart(m_track, u"part", 0.0, 2.0) : m_track;
+            addClip(holder, u"clip", 0.0, 2.0);
+            for (int copies = 1; copies < count; copies *= 2) {
+                copy(0.0, 2.0, 2.0);
+                gatherIn(holder);
+            }
+        });
+    }
+
+    /// What it takes to find, and to join, what goes on where the first halves of all copies end, when that is what stands
+    /// at `start` in the clip. It is the second half of each for 1, and fits to none for 0.
+    double secondsToJoin(double start)
+    {
+        edit(u"Cut", [&] {
+            copy(0.0, 1.0, 10.0);
+            copy(start, start + 1.0, 11.0);
+        });
+        return secondsOf([&] {
+            edit(u"Join", [&] {
+                const int32 result = editService()->closeRange(document(), m_list.get(), 10.0, 12.0, 0.0);
+                EXPECT_EQ(result, start == 1.0 ? ResultOk : ResultFalse);
+            });
+        });
+    }
+
+private:
+    void copy(double start, double end, double destination)
+    {
+        editService()->copyRange(document(), m_list.get(), 0, start, end, destination);
+    }
+    void gatherIn(const TestHost::Node& holder)
+    {
+        const auto copied = m_areInAPart ? childrenOf(*m_track)[1] : m_track;
+        for (const auto& clip : childrenOf(*copied)) {
+            if (m_areInAPart)
+                transaction()->move(copied.get(), holder.get(), clip.get());
+            clip->setStart(nullptr, 0, 0.0);
+        }
+        if (m_areInAPart)
+            transaction()->remove(m_track.get(), copied.get());
+    }
+
+    const bool m_areInAPart;
+    TestHost::Node m_track = addTrack(TypeWord::Audio, u"DX 1");
+    Counted<IObjectList> m_list = create<IObjectList>(context());
+};
+
 double secondsToEdit(int clips)
 {
     return secondsOf([=] {
@@ -201,6 +255,29 @@ TEST(LargeProject, NoEditIsQuadraticInWhatIsStackedOnOneTrack)
         const double many = std::min(secondsToConform(stack, 8000), secondsToConform(stack, 8000));
         EXPECT_LT(many, 8.0 * few) << static_cast<int>(stack);
     }
+}
+
+TEST(LargeProject, NoJoinIsQuadraticInCopiesOfOneClip)
+{
+    StackedCopies(512, false).secondsToJoin(1.0);
+
+    for (const bool areInAPart : {false, true}) {
+        const auto seconds = [&](int count) { return StackedCopies(count, areInAPart).secondsToJoin(1.0); };
+        const double few = std::max(seconds(4096), seconds(4096));
+        const double many = std::min(seconds(16384), seconds(16384));
+        EXPECT_LT(many, 8.0 * few) << areInAPart;
+    }
+}
+
+TEST(LargeProject, NoSearchForWhatToJoinIsQuadraticInCopiesOfOneClip)
+{
+    const auto seconds = [](int count) { return StackedCopies(count, false).secondsToJoin(0.0); };
+    seconds(512);
+
+    const double few = std::max(seconds(4096), seconds(4096));
+    const double many = std::min(seconds(16384), seconds(16384));
+
+    EXPECT_LT(many, 8.0 * few);
 }
 
 } // namespace standin::tests

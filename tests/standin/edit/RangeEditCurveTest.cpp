@@ -197,6 +197,19 @@ TEST(AutomationInRanges, ACopyOntoItselfChangesNothing)
     EXPECT_EQ(film.volumeOf(film.track), before);
 }
 
+TEST(AutomationInRanges, ACopyOntoItselfThatEndsAtAStepOfTheUsersLeavesBothPointsOfIt)
+{
+    Film film;
+    film.addVolume(film.track, {{0, 1.0f}, {10, 0.25f}, {10, 0.75f}, {20, 0.5f}});
+    childrenOf(*film.curveOf(film.track, Envelope::Curve::Volume))[1]->setName(nullptr, text(u"door shuts").get(), 0);
+    const std::string before = film.dump();
+
+    film.copyRange({film.track}, 4, 10, 4);
+    film.copyRange({film.track}, 10, 16, 10);
+
+    EXPECT_EQ(film.dump(), before);
+}
+
 TEST(AutomationInRanges, TheEdgesBetweenNeighbouringCopiesCloseAgainInWhateverOrderTheyAreMade)
 {
     Film whole;

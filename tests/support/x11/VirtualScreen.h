@@ -18,6 +18,8 @@ public:
     VirtualScreen& operator=(const VirtualScreen&) = delete;
     ~VirtualScreen();
 
+    /// Makes the names known that a window manager would.
+    void introduceNames();
     /// What the user has set as dots per inch for all programs; any text, as a user may have written it.
     void setDpi(const std::string& dpi);
 
