@@ -1,10 +1,14 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+
 # Each target does all its own set-up: it installs what is missing, configures and builds.
 #
 #   make run            carries the sound of the example reel over to its new cut, into build/run
 #   make test           every test; PRESET=asan runs them under the sanitizers
 #   make build          the programs into build/release/bin, the libraries into build/release/lib
 #   make bench          the benchmarks, and the whole program against its bounds
+#   make notes-pictures the pictures of change notes in docs/pictures
 #   make fuzz           every fuzzer for FUZZ_SECONDS from its corpus
+#   make pictures       draws the pictures of the window anew that the tests compare with; look at each before you keep it
 #   make format         formats every C++ file; make check-format only looks
 
 PRESET ?= release
@@ -12,20 +16,24 @@ FUZZ_SECONDS ?= 20
 
 sources = $(shell find src standin app examples tests bench fuzz -name '*.cpp' -o -name '*.h')
 reel3 = examples/reel3
+picture_tests = cadrel_gui_window_tests
 
-.PHONY: run test build bench fuzz format check-format clean
+.PHONY: run test build bench fuzz pictures notes-pictures format check-format clean
 
 run:
 	@cmake/build.sh release cadrel
 	@mkdir -p build/run
 	build/release/bin/cadrel apply $(reel3)/reel3.stage --old $(reel3)/reel3_v07.edl --new $(reel3)/reel3_v12.edl \
-	    --vfx 'VFX_****_v,_comp' -o build/run/reel3_v12.stage --overwrite --json build/run/reel3_v12.json >build/run/reel3_v12.txt
-	@sed '/^$$/q' build/run/reel3_v12.txt
+	    --vfx 'VFX_****_v,_comp' -o build/run/reel3_v12.stage --overwrite --notes build/run/reel3_notes.html \
+	    --json build/run/reel3_v12.json --clips >build/run/reel3_v12.txt
+	@sed '/^Clip by clip$$/,$$d' build/run/reel3_v12.txt
+	@echo "Every change, step by step, stands in build/run/reel3_notes.html."
 	@echo "Every move and every marker stands in build/run/reel3_v12.txt, as JSON in build/run/reel3_v12.json."
 	@echo "The project: build/release/bin/cadrel show build/run/reel3_v12.stage"
 
 test:
 	@cmake/build.sh $(PRESET)
+	@cmake/install-packages.sh tests
 	ctest --test-dir build/$(PRESET) --parallel $$(nproc) --output-on-failure --no-tests=error \
 	    --output-junit "$(CURDIR)/build/$(PRESET)/tests.xml"
 
@@ -38,9 +46,19 @@ bench:
 	build/release/bin/cadrel_bench_host
 	build/release/bin/cadrel_bench_program build/release/bin/cadrel build/bench
 
+notes-pictures:
+	@cmake/build.sh release cadrel make_cuts
+	@cmake/install-packages.sh pictures
+	docs/make-pictures.sh build/release/bin
+
 fuzz:
 	@cmake/build.sh fuzz fuzzers
 	fuzz/run.sh build/fuzz $(FUZZ_SECONDS)
+
+pictures:
+	@cmake/build.sh release $(picture_tests)
+	@for program in $(picture_tests); do CADREL_RENEW_PICTURES=1 build/release/bin/$$program; done
+	@git status --short tests/gui/pictures
 
 format:
 	@cmake/install-packages.sh format

@@ -1,3 +1,5 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+
 # The JUCE modules, built once from Debian's juce-modules-source. Their headers are system headers, and their own code has none
 # of our warnings.
 

@@ -1,4 +1,5 @@
 #!/bin/sh
+# SPDX-License-Identifier: GPL-3.0-or-later
 # build.sh PRESET [TARGET...]: installs what is missing, configures build/PRESET and builds the targets, or everything.
 set -eu
 cd "$(dirname "$0")/.."

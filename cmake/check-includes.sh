@@ -1,4 +1,5 @@
 #!/bin/sh
+# SPDX-License-Identifier: GPL-3.0-or-later
 # check-includes.sh [TREE]: holds every include of src, standin and app that names a file of the tree against the table
 # "Rooms" in the tree's CONTRIBUTING.md. Prints what is refused, and fails then. Without TREE it is this one.
 set -eu

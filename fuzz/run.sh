@@ -1,4 +1,5 @@
 #!/bin/sh
+# SPDX-License-Identifier: GPL-3.0-or-later
 # run.sh BUILD SECONDS: runs every fuzzer of a build folder from its corpus for so many seconds each. The corpus is only
 # read; what a run finds on its way goes to BUILD/found, and an input that breaks something to BUILD/broken.
 set -eu

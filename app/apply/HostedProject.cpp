@@ -4,6 +4,7 @@
 
 #include "app/console/Failure.h"
 #include "app/console/Interruption.h"
+#include "app/console/Paths.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
 #include "app/project/ProjectAccess.h"
@@ -163,8 +164,8 @@ void HostedProject::save(const std::string& file, const std::optional<util::File
 {
     try {
         m_application.saveProject(*m_project, file, expected);
-    } catch (const ProjectFileChanged& error) {
-        throw changedFailure(error, file);
+    } catch (const ProjectFileChanged&) {
+        throw writtenMeanwhile(file);
     } catch (const ProjectFileError& error) {
         throw writingFailure(error, file);
     }

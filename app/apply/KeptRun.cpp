@@ -6,7 +6,7 @@
 #include "app/apply/RunMaterial.h"
 #include "app/console/Failure.h"
 #include "app/console/Wording.h"
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/KeepPlanner.h"
 #include "core/keep/KeptChangeList.h"
@@ -94,7 +94,7 @@ private:
     bool m_isNeeded;
 };
 
-KeepContext contextOf(const DataModel& model, const standin::Project& project, bool isForced)
+KeepContext contextOf(const DataModel& model, const standin::Project& project)
 {
     const Settings& settings = model.settings();
     KeepContext context;
@@ -104,7 +104,6 @@ KeepContext contextOf(const DataModel& model, const standin::Project& project, b
     context.material = RunMaterial(project, settings).stretches();
     if (settings.restrictRange())
         context.preserve = SecondsRange{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()};
-    context.isForced = isForced;
     return context;
 }
 
@@ -190,14 +189,17 @@ SecondsRange intersect(const SecondsRange& a, const SecondsRange& b)
 } // namespace
 
 KeptRun::KeptRun(DataModel& model, const standin::Project& project, const ProjectClock& clock, Source source,
-                 bool isForced, const std::string& inputs)
+                 const std::string& inputs, const Doubt& doubt)
 {
-    const KeepContext context = contextOf(model, project, isForced);
+    const KeepContext context = contextOf(model, project);
     const KeepPlanner planner(context);
     m_plan = source == Source::Given ? planner.planGiven(model.changeEdl())
                                      : planner.plan(model.oldEdl(), model.newEdl(), model.changeEdl());
+    const RangeTexts texts(clock, project.timeOrigin(), context.framerate);
+    for (const KeepRefusal& question : m_plan.questions)
+        doubt(failureOf(question, texts, inputs));
     if (m_plan.refusal)
-        throw failureOf(*m_plan.refusal, RangeTexts(clock, project.timeOrigin(), context.framerate), inputs);
+        throw failureOf(*m_plan.refusal, texts, inputs);
     if (m_plan.needsRun()) {
         m_bounds = core::hullSeconds(m_plan, context.framerate);
         if (context.preserve)

@@ -7,6 +7,7 @@
 #include "core/time/SecondsRange.h"
 
 #include <cstddef>
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
@@ -23,6 +24,7 @@ namespace cadrel::app {
 
 class HostedProject;
 class ProjectClock;
+struct Failure;
 
 /// A run that leaves alone what the new cut doesn't speak of: it is planned first, and then restricted to the stretch that
 /// has to change.
@@ -31,10 +33,13 @@ public:
     /// Where the change EDL of the model is from.
     enum class Source { Generated, Given };
 
+    /// Gets what the user has to decide first, and throws it where he hasn't.
+    using Doubt = std::function<void(const Failure&)>;
+
     /// Plans the run of the model's change list, and puts the list that is carried out into the model when the list was
-    /// generated. Throws Failure where the user has to decide first, unless forced; `inputs` names the EDLs.
+    /// generated. Throws Failure for what can't be done; `inputs` names the EDLs.
     KeptRun(core::DataModel& model, const standin::Project& project, const ProjectClock& clock, Source source,
-            bool isForced, const std::string& inputs);
+            const std::string& inputs, const Doubt& doubt);
 
     bool needsRun() const { return m_bounds.has_value(); }
     /// What may change, in seconds of the project's clock. The run is needed.

@@ -9,9 +9,9 @@
 #include "core/edl/ProgrammePlace.h"
 #include "core/keep/Material.h"
 #include "core/keep/PastRuns.h"
-#include "core/keep/PictureLine.h"
-#include "core/keep/PictureNames.h"
 #include "core/model/DataModel.h"
+#include "core/picture/PictureLine.h"
+#include "core/picture/PictureNames.h"
 #include "core/settings/MatchBy.h"
 #include "core/settings/VfxNameMatcher.h"
 #include "core/time/Timecode.h"
@@ -46,14 +46,6 @@ constexpr std::size_t FewestEventsForAName = 8;
 FrameRanges intersect(const FrameRanges& a, const FrameRanges& b)
 {
     return without(a, without(a, b));
-}
-
-std::int32_t lengthOf(const FrameRanges& ranges)
-{
-    std::int32_t frames = 0;
-    for (const FrameRange& range : ranges)
-        frames += range.length();
-    return frames;
 }
 
 bool isLessThanHalf(const FrameRanges& part, const FrameRanges& whole)

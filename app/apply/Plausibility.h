@@ -3,7 +3,7 @@
 #pragma once
 
 #include "app/console/Failure.h"
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 #include "core/time/Framerate.h"
 
 #include <optional>

@@ -14,7 +14,7 @@ namespace cadrel::app {
 
 using util::Result;
 
-Output::Output(const std::string& path) : m_path(path)
+Output::Output(const std::string& path, bool mayReplace) : m_path(path), m_mayReplace(mayReplace)
 {
     if (isStandardOutput(path))
         return;
@@ -28,6 +28,8 @@ void Output::orUnwritable(Action action)
 {
     try {
         action();
+    } catch (const util::FileReplacement::TargetChanged&) {
+        throw writtenMeanwhile(m_path);
     } catch (const Result::Type&) {
         throw unwritable({m_path});
     }
@@ -45,7 +47,11 @@ void Output::write(std::string_view text)
 void Output::finish()
 {
     if (m_file)
-        orUnwritable([&] { m_file->finish(); });
+        orUnwritable([&] {
+            m_file->finish();
+            if (!m_mayReplace)
+                m_file->requireUnchanged(util::FileStamp());
+        });
     else
         flushStandardOutput();
 }
@@ -54,7 +60,7 @@ void Output::place()
 {
     finish();
     if (m_file)
-        orUnwritable([&] { m_file->commit(); });
+        orUnwritable([&] { m_file->commit(m_mayReplace ? std::nullopt : std::optional(util::FileStamp())); });
 }
 
 void flushStandardOutput()

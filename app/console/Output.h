@@ -18,7 +18,8 @@ public:
     /// Whether the user wants it, and in a file.
     static bool isFile(const std::string& path) { return !path.empty() && !isStandardOutput(path); }
 
-    explicit Output(const std::string& path);
+    /// With `mayReplace` false a file that comes up under the name meanwhile stays, and ending the writing fails.
+    Output(const std::string& path, bool mayReplace);
 
     void write(std::string_view text);
     /// Ends the writing; then all of it is on the disk, and what stood in its place still stands there.
@@ -31,6 +32,7 @@ private:
     void orUnwritable(Action action);
 
     std::string m_path;
+    bool m_mayReplace;
     std::optional<util::FileReplacement> m_file; ///< nothing for standard output
 };
 

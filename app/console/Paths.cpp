@@ -144,4 +144,9 @@ Failure unwritable(const std::vector<std::string>& paths)
     return {paths.front(), "can't be written", "see whether the disk is full, or give another name"};
 }
 
+Failure writtenMeanwhile(const std::string& path)
+{
+    return {path, "another program has written it meanwhile", "look at what it has written, and run again"};
+}
+
 } // namespace cadrel::app

@@ -30,5 +30,7 @@ void requireEdlSize(const std::string& path);
 /// Why a file could not be read, or one of several not written, as far as the file system tells.
 Failure unreadable(const std::string& path, FileKind kind = FileKind::Edl);
 Failure unwritable(const std::vector<std::string>& paths);
+/// For a file that a run doesn't replace, since another program has written it while it ran.
+Failure writtenMeanwhile(const std::string& path);
 
 } // namespace cadrel::app

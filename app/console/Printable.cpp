@@ -3,6 +3,7 @@
 #include "app/console/Printable.h"
 
 #include "util/PrintableCharacter.h"
+#include "util/Utf8Text.h"
 
 #include <clocale>
 #include <cwchar>
@@ -11,40 +12,6 @@
 namespace cadrel::app {
 
 namespace {
-
-struct Character {
-    std::size_t bytes = 0; ///< 0 where the text doesn't begin with a well-formed character
-    char32_t value = 0;
-};
-
-Character decode(char32_t lead, std::size_t bytes, char32_t least, std::string_view text)
-{
-    if (text.size() < bytes)
-        return {};
-    char32_t value = lead;
-    for (const char next : text.substr(1, bytes - 1)) {
-        const auto unit = static_cast<unsigned char>(next);
-        if ((unit & 0xc0U) != 0x80U)
-            return {};
-        value = (value << 6U) | (unit & 0x3fU);
-    }
-    const bool surrogate = value >= 0xd800 && value <= 0xdfff;
-    return value < least || value > 0x10ffff || surrogate ? Character{} : Character{bytes, value};
-}
-
-Character firstCharacter(std::string_view text)
-{
-    const auto lead = static_cast<unsigned char>(text.front());
-    if (lead < 0x80)
-        return {1, lead};
-    if ((lead & 0xe0U) == 0xc0U)
-        return decode(lead & 0x1fU, 2, 0x80, text);
-    if ((lead & 0xf0U) == 0xe0U)
-        return decode(lead & 0x0fU, 3, 0x800, text);
-    if ((lead & 0xf8U) == 0xf0U)
-        return decode(lead & 0x07U, 4, 0x10000, text);
-    return {};
-}
 
 /// The first letter of Latin-1 after its control characters.
 constexpr unsigned char FirstLatin1Letter = 0xa0;
@@ -77,7 +44,7 @@ std::string latin1ToUtf8(unsigned char letter)
 
 Shown firstShown(std::string_view text)
 {
-    const Character character = firstCharacter(text);
+    const util::Utf8Character character = util::firstUtf8Character(text);
     if (character.bytes != 0 && util::isPrintable(character.value))
         return {character.bytes, std::string(text.substr(0, character.bytes)), columnsOf(character.value)};
     const auto byte = static_cast<unsigned char>(text.front());
@@ -116,7 +83,7 @@ std::size_t displayWidth(std::string_view utf8)
 {
     std::size_t width = 0;
     while (!utf8.empty()) {
-        const Character character = firstCharacter(utf8);
+        const util::Utf8Character character = util::firstUtf8Character(utf8);
         width += columnsOf(character.value);
         utf8.remove_prefix(character.bytes == 0 ? 1 : character.bytes);
     }
@@ -126,7 +93,7 @@ std::size_t displayWidth(std::string_view utf8)
 bool isUtf8(std::string_view text)
 {
     while (!text.empty()) {
-        const Character character = firstCharacter(text);
+        const util::Utf8Character character = util::firstUtf8Character(text);
         if (character.bytes == 0)
             return false;
         text.remove_prefix(character.bytes);

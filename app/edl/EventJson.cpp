@@ -2,6 +2,7 @@
 
 #include "app/edl/EventJson.h"
 
+#include "app/edl/EventWords.h"
 #include "core/edl/EventList.h"
 #include "core/edl/HealedEvent.h"
 
@@ -13,6 +14,8 @@ using nlohmann::ordered_json;
 
 namespace {
 
+constexpr int Schema = 1;
+
 ordered_json toJson(const EventBase& event)
 {
     ordered_json members = ordered_json::array();
@@ -21,10 +24,10 @@ ordered_json toJson(const EventBase& event)
             members.push_back(toJson(*member));
     }
     return {{"number", event.eventNumber()},
-            {"kind", event.eventKind()},
+            {"kind", kindWordOf(event)},
             {"roll", event.rollName()},
             {"clip", event.clipName()},
-            {"transition", event.transitionType()},
+            {"transition", transitionWordOf(event)},
             {"duration", event.transitionDuration()},
             {"srcIn", event.srcIn().toString()},
             {"srcOut", event.srcOut().toString()},
@@ -32,7 +35,7 @@ ordered_json toJson(const EventBase& event)
             {"dstOut", event.dstOut().toString()},
             {"speed", event.signedSpeed()},
             {"vfx", event.vfx()},
-            {"flaws", event.flaws()},
+            {"flaws", flawWordsOf(event)},
             {"edlFile", event.edlFileName()},
             {"members", std::move(members)}};
 }
@@ -46,7 +49,7 @@ std::string textOf(const ordered_json& value)
 
 void EventJson::write(Events events, const ordered_json& furtherKeys, const Sink& sink, const KeysOf& keysOf)
 {
-    sink("{\n\"events\": [");
+    sink("{\n\"schema\": " + std::to_string(Schema) + ",\n\"events\": [");
     const char* separator = "\n";
     for (std::size_t index = 0; index < events.size(); ++index) {
         ordered_json event = toJson(*events[index]);

@@ -13,10 +13,8 @@
 
 namespace cadrel::app {
 
-/// Events as JSON for other programs: `{"events": [...]}`, and further keys after it.
-///
-/// "kind" is 0 for a plain event and 1 for a healed one, "transition" 0 for a cut, 1 for a dissolve and 2 for a wipe,
-/// "duration" its length in frames, "flaws" are the numbers of EventFlaw. Bytes that are no UTF-8 become U+FFFD.
+/// Events as JSON for other programs: `{"schema": 1, "events": [...]}`, and further keys after it.
+/// docs/common.schema.json describes an event. Bytes that are no UTF-8 become U+FFFD.
 class EventJson {
 public:
     using Events = std::span<const std::shared_ptr<core::EventBase>>;

@@ -4,11 +4,13 @@
 
 #include "app/console/Printable.h"
 #include "app/edl/ScreenTimecode.h"
+#include "app/edl/TransitionFault.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
 #include <cstdio>
 #include <ostream>
+#include <vector>
 
 namespace cadrel::app {
 
@@ -35,10 +37,22 @@ bool hasUsableTimecodes(const EventBase& event)
 std::string stateOf(const EventBase& event)
 {
     if (event.isValid())
-        return "ok";
+        return transitionFaultOf(event).empty() ? "ok" : "length";
     if (event.hasFormatFlaw())
         return "format";
     return hasUsableTimecodes(event) ? "range" : "timecode";
+}
+
+/// What is wrong with an event, a line each.
+std::vector<std::string> faultsOf(const EventBase& event)
+{
+    std::vector<std::string> faults = util::StringUtil::split(event.flawsText(), '\n', true);
+    std::string ofTransition = transitionFaultOf(event);
+    if (!ofTransition.empty()) {
+        ofTransition.front() = 'T';
+        faults.push_back(ofTransition + '.');
+    }
+    return faults;
 }
 
 std::string padded(std::int64_t number)
@@ -93,17 +107,16 @@ void EventTable::print(std::ostream& out) const
     for (const auto& event : m_events) {
         const Row row = rowOf(*event, widths);
         const std::string line = lineOf(row, widths);
+        const std::vector<std::string> faults = faultsOf(*event);
         if (!m_colour) {
             out << line << '\n';
         } else {
             const std::size_t state = row.front().size();
-            out << (event->isValid() ? Green : Red) << std::string_view(line).substr(0, state) << Plain
+            out << (faults.empty() ? Green : Red) << std::string_view(line).substr(0, state) << Plain
                 << std::string_view(line).substr(state) << '\n';
         }
-        if (!event->isValid()) {
-            for (const std::string& flaw : util::StringUtil::split(event->flawsText(), '\n', true))
-                out << "          " << toPrintable(flaw).text << '\n';
-        }
+        for (const std::string& fault : faults)
+            out << "          " << toPrintable(fault).text << '\n';
     }
 }
 

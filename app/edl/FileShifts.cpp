@@ -7,9 +7,9 @@
 #include "app/console/Terminal.h"
 #include "app/edl/EdlLoader.h"
 #include "core/edl/EventBase.h"
-#include "core/keep/FrameRange.h"
-#include "core/keep/PictureLine.h"
-#include "core/keep/PictureNames.h"
+#include "core/picture/FrameRange.h"
+#include "core/picture/PictureLine.h"
+#include "core/picture/PictureNames.h"
 #include "core/settings/MatchBy.h"
 #include "core/time/Timecode.h"
 

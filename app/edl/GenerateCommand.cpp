@@ -67,11 +67,20 @@ std::vector<std::string> filesOf(const std::string& path, std::size_t eventCount
     return files;
 }
 
-void saveChangeEdl(const EventList& changeEvents, const std::string& path, const std::vector<std::string>& files)
+void saveChangeEdl(const EventList& changeEvents, const std::string& path, const std::vector<std::string>& files,
+                   bool mayReplace)
 {
     using Mode = CmxWriter::FrameCountMode;
-    CmxWriter writer(Timecode::framerate().dropFrame == 1 ? Mode::DropFrame : Mode::Unsaid);
-    if (writer.write(toWide(path), changeEvents) != Result::Ok)
+    using Existing = CmxWriter::Existing;
+    CmxWriter writer(Timecode::framerate().dropFrame == 1 ? Mode::DropFrame : Mode::Unsaid,
+                     mayReplace ? Existing::Replaced : Existing::Kept);
+    const Result::Type result = writer.write(toWide(path), changeEvents);
+    if (result == Result::Refused) {
+        const auto there =
+            std::find_if(files.begin(), files.end(), [](const std::string& file) { return fs::exists(file); });
+        throw writtenMeanwhile(there == files.end() ? path : *there);
+    }
+    if (result != Result::Ok)
         throw unwritable(files);
 }
 
@@ -181,12 +190,12 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     files.leftOver = leftOver(options.changeFile, used);
     std::optional<Output> json;
     if (Output::isFile(options.jsonFile)) {
-        json.emplace(options.jsonFile);
+        json.emplace(options.jsonFile, options.replacing.isAllowed);
         writeJson(*json, model, report, rate, files);
         json->finish();
     }
     if (!options.changeFile.empty())
-        saveChangeEdl(model.changeEdl(), options.changeFile, files.change);
+        saveChangeEdl(model.changeEdl(), options.changeFile, files.change, options.replacing.isAllowed);
     backups.keep();
     if (json)
         json->place();
@@ -194,7 +203,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
 
     terminal.clearProgress();
     if (Output::isStandardOutput(options.jsonFile)) {
-        Output output(options.jsonFile);
+        Output output(options.jsonFile, true);
         writeJson(output, model, report, rate, files);
         output.place();
         return;

@@ -6,6 +6,7 @@
 #include "app/console/Paths.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
+#include "app/edl/TransitionFault.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/settings/VfxNameMatcher.h"
@@ -75,6 +76,9 @@ Failure failureOf(const GenerationFailure& failed, Result::Type result, const Ge
                 remedy};
     if (newEvent != nullptr || oldEvent != nullptr) {
         const EventBase& event = newEvent != nullptr ? *newEvent : *oldEvent;
+        if (const std::string fault = transitionFaultOf(event); !fault.empty())
+            return {event.edlFileName(), nameOf(event) + " can't be used: " + fault,
+                    "correct the duration of the " + transitionNameOf(event) + " or leave the event out"};
         return {event.edlFileName(), nameOf(event) + " can't be used" + reason, remedy};
     }
     return {joined(inputsOf(options)), "no change EDL can be made" + reason, "check the timecodes"};

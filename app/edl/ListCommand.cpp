@@ -13,6 +13,7 @@
 #include "app/edl/EventTable.h"
 #include "app/edl/ProjectFramerate.h"
 #include "app/edl/ScreenTimecode.h"
+#include "app/edl/TransitionFault.h"
 #include "core/edl/EventBase.h"
 #include "core/time/Timecode.h"
 
@@ -35,6 +36,7 @@ struct Totals {
     std::size_t events = 0;
     std::size_t invalid = 0;
     std::array<std::size_t, 3> byTransition{}; ///< by TransitionType
+    std::size_t overlong = 0;                  ///< with a transition that is longer than the event
     std::size_t retimed = 0;                   ///< of the valid events
     std::size_t reversed = 0;                  ///< of the retimed events
     std::size_t unreadLines = 0;
@@ -44,6 +46,7 @@ struct Totals {
     void count(const EventBase& event)
     {
         ++events;
+        overlong += transitionFaultOf(event).empty() ? 0U : 1U;
         ++byTransition.at(static_cast<std::size_t>(event.transitionType()));
         if (!event.isValid()) {
             ++invalid;
@@ -73,9 +76,12 @@ std::string toText(const Totals& totals, const std::string& rate)
 {
     std::string text =
         "Events      " + std::to_string(totals.events) + ", " +
-        (totals.invalid == 0 ? "all valid" : std::to_string(totals.invalid) + " invalid") + "\n" + "            " +
-        counted(totals.byTransition[0], "cut") + ", " + counted(totals.byTransition[1], "dissolve") + ", " +
-        counted(totals.byTransition[2], "wipe") + ", " + std::to_string(totals.retimed) + " retimed" +
+        (totals.invalid == 0 ? "all valid" : std::to_string(totals.invalid) + " invalid") +
+        (totals.overlong == 0 ? ""
+                              : ", " + std::to_string(totals.overlong) + " with a transition longer than the event") +
+        "\n" + "            " + counted(totals.byTransition[0], "cut") + ", " +
+        counted(totals.byTransition[1], "dissolve") + ", " + counted(totals.byTransition[2], "wipe") + ", " +
+        std::to_string(totals.retimed) + " retimed" +
         (totals.reversed == 0 ? "" : ", " + std::to_string(totals.reversed) + " of them reversed") + "\n";
     if (totals.unreadLines > 0)
         text += "Not read    " + counted(totals.unreadLines, "line") + "\n";
@@ -96,7 +102,7 @@ std::vector<std::shared_ptr<EventBase>> allEvents(const std::list<LoadedEdl>& ed
     return events;
 }
 
-void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const std::string& path)
+void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const ListOptions& options)
 {
     std::vector<std::string> names;
     std::vector<UnreadOfFile> unread;
@@ -105,9 +111,9 @@ void writeJson(const std::list<LoadedEdl>& edls, const std::string& rate, const 
         unread.push_back({names.back(), edl.remarks.unreadLines});
     }
     std::optional<Interruption> interruption;
-    if (!Output::isStandardOutput(path))
+    if (!Output::isStandardOutput(options.jsonFile))
         interruption.emplace();
-    Output json(path);
+    Output json(options.jsonFile, options.isReplacing);
     EventJson::write(allEvents(edls), {{"files", names}, {"rate", rate}, {"unread", toJson(unread)}},
                      [&json](std::string_view text) { json.write(text); });
     json.place();
@@ -132,7 +138,7 @@ void runList(const ListOptions& options, Terminal& terminal)
 
     terminal.clearProgress();
     if (!options.jsonFile.empty())
-        writeJson(edls, label, options.jsonFile);
+        writeJson(edls, label, options);
     if (jsonOnly)
         return;
     if (!options.summary) {

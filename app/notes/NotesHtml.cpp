@@ -6,6 +6,7 @@
 #include "app/console/Wording.h"
 #include "app/notes/NotesPage.h"
 #include "app/notes/NotesWording.h"
+#include "app/notes/SoundWording.h"
 
 #include <algorithm>
 #include <array>
@@ -66,11 +67,22 @@ KindLabel labelOf(ChangeKind kind)
     return {"transition", "transition"};
 }
 
-constexpr std::array Filters{std::pair{"kept", "kept"},           std::pair{"trimmed", "trimmed"},
-                             std::pair{"lifted", "lifted"},       std::pair{"inserted", "inserted"},
-                             std::pair{"replaced", "replaced"},   std::pair{"moved", "moved"},
-                             std::pair{"doubled", "doubled"},     std::pair{"retimed", "retimed"},
-                             std::pair{"version", "VFX version"}, std::pair{"transition", "transitions"}};
+struct Filter {
+    const char* value;
+    const char* label;
+    const char* hue; ///< the colour of its marks
+};
+
+constexpr std::array Filters{Filter{"kept", "kept", "kept"},
+                             Filter{"trimmed", "trimmed", "lifted"},
+                             Filter{"lifted", "lifted", "lifted"},
+                             Filter{"inserted", "inserted", "inserted"},
+                             Filter{"replaced", "replaced", "other"},
+                             Filter{"moved", "moved", "moved"},
+                             Filter{"doubled", "doubled", "doubled"},
+                             Filter{"retimed", "retimed", "other"},
+                             Filter{"version", "VFX version", "other"},
+                             Filter{"transition", "transitions", "other"}};
 
 std::string escaped(const std::string& text)
 {
@@ -105,8 +117,8 @@ public:
 
     void write()
     {
-        const std::string title = "Change notes: " + escaped(joined(m_document.cuts.oldNames)) + " to " +
-                                  escaped(joined(m_document.cuts.newNames));
+        const std::string title =
+            "Change notes: " + escaped(m_words.cutName(false)) + " to " + escaped(m_words.cutName(true));
         m_sink("<!DOCTYPE html>\n<html lang=\"en\">\n<head>\n<meta charset=\"utf-8\">\n"
                "<meta http-equiv=\"Content-Security-Policy\" content=\"default-src 'none'; style-src 'unsafe-inline'; "
                "script-src 'unsafe-inline'\">\n<meta name=\"viewport\" content=\"width=device-width\">\n<title>" +
@@ -117,8 +129,10 @@ public:
         writePicture();
         writeTools();
         writeLargest();
+        writeReels();
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
             writeReel(reel);
+        writeElsewhere();
         writeRemarks();
         m_sink("</main>\n<script>");
         m_sink(NotesPage::Script);
@@ -140,6 +154,15 @@ private:
                number(m_words.change(totals.after - totals.before), "change of length") +
                number(time(totals.lifted), "lifted") + number(time(totals.inserted), "inserted") +
                number(time(totals.moved), "moved") + number(time(totals.doubled), "doubled") + "</ul>\n");
+        if (m_document.sound == nullptr)
+            return;
+        m_sink("<p class=\"dim\">Sound: ");
+        const char* separator = "";
+        for (const std::string& total : SoundWording(*m_document.sound).totals()) {
+            m_sink(separator + escaped(total));
+            separator = "<br>";
+        }
+        m_sink("</p>\n");
     }
 
     /// Old and new programme as strips, each kept stretch as a band from one to the other.
@@ -148,7 +171,7 @@ private:
         const auto& notes = m_document.notes;
         const std::int32_t width = std::max({1, notes.oldCut().length(), notes.newCut().length()});
         m_sink("<div class=\"strip\"><div><span>old cut</span><span class=\"tc\">" + timesOf(notes.oldCut()) +
-               "</span></div>\n<svg viewBox=\"0 0 " + std::to_string(width) +
+               "</span></div>\n" + numbersOf(true) + "<svg viewBox=\"0 0 " + std::to_string(width) +
                " 190\" preserveAspectRatio=\"none\" tabindex=\"0\" role=\"img\" aria-label=\"Old and new programme; "
                "plus and minus zoom, the arrows go along\">\n" +
                box({0, notes.oldCut().length()}, true, "base", {}, {}) +
@@ -165,8 +188,27 @@ private:
                        std::to_string(isOld ? OldBottom : NewBottom) + "\"/>\n");
             }
         }
-        m_sink("</svg>\n<div><span>new cut</span><span class=\"tc\">" + timesOf(notes.newCut()) +
-               "</span></div></div>\n");
+        m_sink("</svg>\n" + numbersOf(false) + "<div><span>new cut</span><span class=\"tc\">" +
+               timesOf(notes.newCut()) + "</span></div></div>\n");
+    }
+
+    /// The numbers of the reels, where the script puts them over their starts.
+    std::string numbersOf(bool isOld) const
+    {
+        const auto& reels = m_document.notes.reels();
+        if (reels.size() < 2)
+            return {};
+        std::string html = "<div class=\"reels\">";
+        for (std::size_t reel = 0; reel < reels.size(); ++reel) {
+            const auto& place = isOld ? reels[reel].pair.oldReel : reels[reel].pair.newReel;
+            if (place)
+                html += concatenated(
+                    {"<b data-at=\"",
+                     std::to_string(
+                         (isOld ? m_document.notes.oldCut() : m_document.notes.newCut()).reels()[*place].start),
+                     "\">", std::to_string(reel + 1), "</b>"});
+        }
+        return html + "</div>\n";
     }
 
     std::string timesOf(const core::Programme& cut) const
@@ -221,8 +263,9 @@ private:
         const std::string title = m_words.action(entry);
         for (const FrameSpan& removed : step.removedFrames)
             m_sink(box(removed, true, "lifted", idOf(entry), title));
-        if (step.action == core::StepAction::Replace && step.inserted.length > 0)
-            m_sink(box(step.inserted, false, "inserted", idOf(entry), title));
+        if (step.inserted.length > 0)
+            m_sink(box(step.inserted, false, step.action == core::StepAction::Relabel ? "version" : "inserted",
+                       idOf(entry), title));
         for (const PictureChange& change : step.changes) {
             if (change.kind == ChangeKind::Doubled)
                 m_sink(band(*change.inOld, *change.inNew, "doubled", idOf(entry)));
@@ -260,12 +303,15 @@ private:
         m_sink("<div class=\"tools\"><button data-zoom=\"0.6\">zoom in</button><button data-zoom=\"1.7\">zoom "
                "out</button><button data-zoom=\"1e9\">all</button>");
         const std::set<std::string> kinds = kindsOfAll();
-        for (const auto& [value, label] : Filters) {
+        for (const auto& [value, label, hue] : Filters) {
             if (kinds.contains(value))
-                m_sink(std::string("<label><input type=\"checkbox\" checked value=\"") + value + "\">" + label +
-                       "</label>");
+                m_sink(concatenated({"<label><input type=\"checkbox\" checked value=\"", value,
+                                     "\"><i style=\"--hue: var(--", hue, ")\"></i>", label, "</label>"}));
         }
-        m_sink("<span class=\"dim\">n and p: next and previous step; + and -: zoom</span></div>\n");
+        if (m_document.sound != nullptr)
+            m_sink("<button data-sound>all sound</button>");
+        m_sink("<span class=\"dim\">n and p: next and previous step; + and -: zoom</span></div>\n"
+               "<p class=\"left\" hidden></p>\n");
     }
 
     std::set<std::string> kindsOfAll() const
@@ -294,23 +340,48 @@ private:
         for (const NoteEntry* const entry : steps) {
             m_sink(
                 concatenated({"<li><a href=\"#", idOf(*entry), "\">step ", std::to_string(entry->number), "</a>: "}) +
-                escaped(m_words.action(*entry)) + ", " +
-                escaped(m_words.describe(NotesWording::largestChange(*entry)).shot) + "</li>\n");
+                escaped(m_words.action(*entry)) + ", " + escaped(m_words.shotsOf(*entry)) + soundSummary(*entry) +
+                "</li>\n");
         }
         m_sink("</ol>\n");
     }
 
+    /// A line a reel where there are several.
+    void writeReels()
+    {
+        const auto& reels = m_document.notes.reels();
+        if (reels.size() < 2)
+            return;
+        m_sink("<h2>The reels</h2>\n<div class=\"wide\"><table "
+               "class=\"overview\">\n<thead><tr><th>reel</th><th>begins</th>"
+               "<th>before</th><th>after</th><th class=\"num\">change</th><th class=\"num\">steps</th></tr></thead>\n"
+               "<tbody>\n");
+        for (std::size_t reel = 0; reel < reels.size(); ++reel) {
+            const std::string number = std::to_string(reel + 1);
+            const std::size_t steps = m_words.stepsOf(reel);
+            m_sink(concatenated({"<tr", steps == 0 ? " class=\"k\"" : "", "><td><a href=\"#r", number, "\">Reel ",
+                                 number, "</a></td><td class=\"tc\">", m_words.reelStart(reel),
+                                 "</td><td class=\"tc\">", m_words.timecode(reels[reel].before),
+                                 "</td><td class=\"tc\">", m_words.timecode(reels[reel].after),
+                                 "</td><td class=\"tc num\">", m_words.change(reels[reel].after - reels[reel].before),
+                                 "</td><td class=\"num\">", std::to_string(steps), "</td></tr>\n"}));
+        }
+        m_sink("</tbody>\n</table></div>\n");
+    }
+
     void writeReel(std::size_t reel)
     {
-        m_sink("<h2>" + escaped(m_words.reelTitle(reel)) + "</h2>\n<p class=\"dim\">" +
-               escaped(m_words.reelLengths(reel)) +
-               "</p>\n<table>\n<thead><tr><th class=\"num\">step</th><th>at</th><th>what to do</th><th>what "
+        m_sink("<h2 id=\"r" + std::to_string(reel + 1) + "\">" + escaped(m_words.reelTitle(reel)) +
+               "</h2>\n<p class=\"dim\">" + escaped(m_words.reelLengths(reel)) +
+               "</p>\n<div class=\"wide\"><table class=\"steps\">\n<thead><tr><th "
+               "class=\"num\">step</th><th>at</th><th>what to "
+               "do</th><th>what "
                "changes</th><th class=\"num\">length</th><th class=\"num\">offset</th></tr></thead>\n<tbody>\n");
         std::size_t kept = 0;
         for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
             m_sink(entry.step() == nullptr ? rowOf(entry, reel, keptId(reel, ++kept))
                                            : rowOf(entry, reel, idOf(entry)));
-        m_sink("</tbody>\n</table>\n");
+        m_sink("</tbody>\n</table></div>\n");
     }
 
     std::string rowOf(const NoteEntry& entry, std::size_t reel, const std::string& id) const
@@ -320,13 +391,14 @@ private:
             return concatenated({"<td class=\"", kind, "\">", html, "</td>"});
         };
         std::string feet;
-        if (m_document.showsFeet && !isKept)
+        if (m_document.layout.showsFeet && !isKept)
             feet = "<p class=\"change\"><small>" + escaped(m_words.inFeet(entry)) + "</small></p>";
         return "<tr id=\"" + id + "\" tabindex=\"0\"" + (isKept ? " class=\"k\"" : "") + " data-kinds=\"" +
                (isKept ? "kept" : filtersOf(*entry.step())) + "\">" +
                cell("num", isKept ? "" : std::to_string(entry.number)) +
                cell("tc", m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel)))) +
-               cell("tc", escaped(m_words.action(entry))) + cell("", isKept ? "" : changesOf(*entry.step()) + feet) +
+               cell("tc", escaped(m_words.action(entry))) +
+               cell("", isKept ? "" : changesOf(*entry.step()) + feet + soundOf(entry)) +
                cell("tc num", entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange)) +
                cell("tc num", m_words.change(entry.runningOffset)) + "</tr>\n";
     }
@@ -339,6 +411,12 @@ private:
         return kinds;
     }
 
+    /// The label stands before it already.
+    static std::string withoutLabel(const std::string& what, const std::string& label)
+    {
+        return what.starts_with(label + " ") ? what.substr(label.size() + 1) : what;
+    }
+
     std::string changesOf(const NoteStep& step) const
     {
         std::string html;
@@ -348,12 +426,58 @@ private:
                 change.frames > 0 && (change.kind == ChangeKind::HeadTrimmed || change.kind == ChangeKind::TailTrimmed);
             html += "<p class=\"change\"><span class=\"tag " + (isLonger ? "plus" : std::string(wordOf(change.kind))) +
                     "\">" + labelOf(change.kind).label + "</span>" + escaped(words.shot) + " <small>" +
-                    escaped(words.what) + (words.more.empty() ? "" : ", " + escaped(words.more)) + "</small></p>";
+                    escaped(withoutLabel(words.what, labelOf(change.kind).label)) +
+                    (words.more.empty() ? "" : ", " + escaped(words.more)) + "</small></p>";
         }
         if (step.joined > 1)
             html += "<p class=\"change\"><small>joined from " + std::to_string(step.joined) +
                     " trims that cancel out</small></p>";
         return html;
+    }
+
+    std::string soundSummary(const NoteEntry& entry) const
+    {
+        const core::StepSound* const sound = m_words.soundOf(entry);
+        if (sound == nullptr || sound->isEmpty())
+            return {};
+        return "<br><small>sound: " + escaped(SoundWording::shortSummary(*sound)) + "</small>";
+    }
+
+    std::string soundOf(const NoteEntry& entry) const
+    {
+        const core::StepSound* const sound = m_words.soundOf(entry);
+        if (sound == nullptr)
+            return {};
+        std::string html;
+        if (!sound->scenes.empty())
+            html += "<p class=\"change\"><small>scene: " + escaped(SoundWording::scenes(*sound)) + "</small></p>";
+        return sound->isEmpty() ? html : html + soundDetails(*sound);
+    }
+
+    /// Folded, but for what it is all about.
+    std::string soundDetails(const core::StepSound& sound) const
+    {
+        const SoundWording words(*m_document.sound);
+        const std::vector<SoundLine> lines = words.lines(sound);
+        if (lines.empty())
+            return "<p class=\"change\"><span class=\"tag sound\">sound</span><small>" + escaped(words.summary(sound)) +
+                   "</small></p>";
+        std::string html = "<details class=\"sound\"><summary><span class=\"tag sound\">sound</span>" +
+                           escaped(words.summary(sound)) + "</summary><ul>";
+        for (const SoundLine& line : lines)
+            html += "<li><span class=\"tc\">" + escaped(line.time) + "</span> " + escaped(line.name) + " <small>" +
+                    escaped(line.what) + "</small></li>";
+        if (const std::string rest = SoundWording::rest(sound); !rest.empty())
+            html += "<li>" + rest + "</li>";
+        return html + "</ul></details>";
+    }
+
+    void writeElsewhere()
+    {
+        if (m_document.sound == nullptr || m_document.sound->notes.elsewhere().isEmpty())
+            return;
+        m_sink(concatenated({"<h2>", SoundWording::ElsewhereTitle, "</h2>\n",
+                             soundDetails(m_document.sound->notes.elsewhere()), "\n"}));
     }
 
     void writeRemarks()

@@ -5,35 +5,41 @@
 namespace cadrel::app {
 
 const std::string_view NotesPage::Style = R"(
-:root { color-scheme: light dark; --paper: #fbfaf8; --ink: #1d1f22; --dim: #6c7178; --line: #dddad4; --card: #fff;
+:root { color-scheme: light dark; --paper: #fbfaf8; --ink: #1d1f22; --dim: #5f646b; --line: #dddad4; --card: #fff;
   --kept: #7d93ad; --moved: #d38a1f; --lifted: #c8453b; --inserted: #2f9460; --doubled: #8a5bbf; --other: #3b78c4; }
-@media (prefers-color-scheme: dark) {
+@media screen and (prefers-color-scheme: dark) {
   :root { --paper: #17191c; --ink: #e4e5e7; --dim: #969ca5; --line: #33373d; --card: #1f2226;
     --kept: #64799a; --moved: #e0a13f; --lifted: #e26a60; --inserted: #4db582; --doubled: #a983d8; --other: #6ba3e6; } }
 * { box-sizing: border-box; }
 body { margin: 0; padding: 28px; background: var(--paper); color: var(--ink); font: 15px/1.45 system-ui, sans-serif; }
 main { max-width: 1180px; margin: 0 auto; }
 h1 { font-size: 25px; margin: 0 0 2px; } h2 { font-size: 18px; margin: 34px 0 2px; }
-p { margin: 0 0 12px; } .dim { color: var(--dim); }
+p { margin: 0 0 12px; overflow-wrap: anywhere; } .dim { color: var(--dim); }
 .numbers { display: flex; flex-wrap: wrap; gap: 10px; margin: 16px 0 22px; padding: 0; list-style: none; }
 .numbers li { background: var(--card); border: 1px solid var(--line); border-radius: 6px; padding: 7px 13px; }
 .numbers b { display: block; font: 600 17px ui-monospace, monospace; } .numbers span { font-size: 13px; color: var(--dim); }
 .strip { background: var(--card); border: 1px solid var(--line); border-radius: 6px; padding: 10px 14px; }
 .strip div { display: flex; justify-content: space-between; gap: 16px; font-size: 13px; color: var(--dim); }
 .strip .tc, td.tc { font-family: ui-monospace, monospace; font-variant-numeric: tabular-nums; white-space: nowrap; }
+.strip .reels { position: relative; display: block; height: 15px; overflow: hidden; font-size: 11px; }
+.reels b { position: absolute; padding-left: 3px; font-weight: 500; }
 svg { display: block; width: 100%; height: 190px; margin: 4px 0; cursor: pointer; }
-svg:focus-visible, tr:focus-visible, button:focus-visible { outline: 2px solid var(--other); outline-offset: 1px; }
+svg:focus-visible, tr:focus-visible, button:focus-visible, summary:focus-visible { outline: 2px solid var(--other); outline-offset: 1px; }
 .base { fill: var(--line); } .reel { stroke: var(--ink); stroke-width: 1.5; vector-effect: non-scaling-stroke; }
 .kept { fill: var(--kept); fill-opacity: .34; } .seen { fill: var(--kept); }
 .moved { fill: var(--moved); fill-opacity: .62; } .doubled { fill: var(--doubled); fill-opacity: .62; }
-.lifted { fill: var(--lifted); } .inserted { fill: var(--inserted); }
+.lifted { fill: var(--lifted); } .inserted { fill: var(--inserted); } .version { fill: var(--other); }
 svg .on { fill-opacity: 1; stroke: var(--ink); stroke-width: 1; vector-effect: non-scaling-stroke; }
-svg [data-step]:hover { fill-opacity: .95; }
+svg [data-step]:hover { fill-opacity: .95; } svg .off { display: none; }
 .tools { display: flex; flex-wrap: wrap; gap: 6px 14px; align-items: center; margin: 14px 0 6px; font-size: 14px; }
 .tools label { display: inline-flex; gap: 5px; align-items: center; }
+.tools i { width: 11px; height: 11px; border-radius: 3px; background: var(--hue); }
 .tools button { font: inherit; padding: 2px 10px; background: var(--card); color: inherit; border: 1px solid var(--line);
   border-radius: 5px; }
-table { width: 100%; border-collapse: collapse; margin-top: 10px; }
+.wide { overflow-x: auto; } table { width: 100%; border-collapse: collapse; margin-top: 10px; }
+.steps { table-layout: fixed; min-width: 780px; } .steps th:nth-child(1) { width: 52px; } .steps th:nth-child(2) { width: 108px; }
+.steps th:nth-child(3) { width: 300px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 118px; }
+.overview { width: auto; } .overview td, .overview th { padding: 2px 18px 2px 10px; } .overview a { color: inherit; }
 th { text-align: left; font-size: 13px; font-weight: 500; color: var(--dim); border-bottom: 1px solid var(--line);
   padding: 4px 10px; }
 td { padding: 6px 10px; border-bottom: 1px solid var(--line); vertical-align: top; }
@@ -41,31 +47,43 @@ td.tc { font-size: 13.5px; } .num { text-align: right !important; }
 tr.k td { padding-top: 2px; padding-bottom: 2px; font-size: 12.5px; color: var(--dim); }
 tr.on td { background: color-mix(in srgb, var(--other) 16%, transparent); }
 tbody tr[id] { scroll-margin-top: 20px; cursor: pointer; }
-.tag { display: inline-block; font-size: 12px; padding: 0 7px; border-radius: 9px; color: #fff; background: var(--other);
-  margin-right: 7px; white-space: nowrap; }
-@media (prefers-color-scheme: dark) { .tag { color: #101214; } }
-.tag.lifted, .tag.head-trimmed, .tag.tail-trimmed { background: var(--lifted); }
-.tag.plus, .tag.inserted { background: var(--inserted); } .tag.moved { background: var(--moved); }
-.tag.doubled { background: var(--doubled); }
-.change { margin: 0 0 2px; } .change small { color: var(--dim); }
+.tag { --hue: var(--other); display: inline-block; font-size: 12px; padding: 0 7px; border-radius: 9px; margin-right: 7px;
+  background: color-mix(in srgb, var(--hue) 26%, transparent); white-space: nowrap; }
+.tag.lifted, .tag.head-trimmed, .tag.tail-trimmed { --hue: var(--lifted); }
+.tag.plus, .tag.inserted { --hue: var(--inserted); } .tag.moved { --hue: var(--moved); }
+.tag.doubled { --hue: var(--doubled); }
+.tag.sound { --hue: var(--kept); }
+details.sound { margin: 3px 0 2px; font-size: 14px; } details.sound summary { cursor: pointer; }
+details.sound ul { margin: 3px 0 5px; padding-left: 20px; list-style: none; } details.sound small { color: var(--dim); }
+details.sound .tc { display: inline-block; min-width: 8.5em; font: 12.5px ui-monospace, monospace; }
+.change { margin: 0 0 2px; overflow-wrap: break-word; } .change small { color: var(--dim); }
 ol.largest { columns: 2; column-gap: 40px; padding-left: 24px; margin: 8px 0; font-size: 14px; }
 ol.largest a { color: inherit; }
 [hidden] { display: none !important; }
 @media (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
-@media print { :root { --paper: #fff; --card: #fff; } body { padding: 0; font-size: 10pt; } .tools { display: none; }
+@media print { :root { color-scheme: light; --paper: #fff; --card: #fff; } .wide { overflow: visible; } body { padding: 0; font-size: 10pt; } .tools { display: none; }
   * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2 { break-after: avoid; }
+  .steps { min-width: 0; } .steps th:nth-child(1) { width: 30px; } .steps th:nth-child(2) { width: 80px; }
+  .steps th:nth-child(3) { width: 220px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 90px; }
   svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } td.tc { font-size: 8pt; }
   tr.k td { font-size: 7.5pt; } }
 )";
 
 const std::string_view NotesPage::Script = R"(
 const svg = document.querySelector('svg'), whole = svg.viewBox.baseVal.width;
-const rows = [...document.querySelectorAll('tr[id]')];
+const rows = [...document.querySelectorAll('tr[id]')], steps = rows.filter(row => !row.classList.contains('k'));
+const marks = [...svg.querySelectorAll('[data-step]')];
+const reelNumbers = [...document.querySelectorAll('.reels b')];
 let left = 0, width = whole, at = -1;
 function show() {
   width = Math.min(whole, Math.max(whole / 2000, width));
   left = Math.min(whole - width, Math.max(0, left));
   svg.setAttribute('viewBox', `${left} 0 ${width} 190`);
+  reelNumbers.forEach(number => {
+    const at = (number.dataset.at - left) / width;
+    number.style.left = `${at * 100}%`;
+    number.hidden = at < 0 || at > 1;
+  });
 }
 function zoom(factor, middle = left + width / 2) {
   const share = (middle - left) / width;
@@ -110,12 +128,27 @@ document.addEventListener('keydown', e => {
   }
   if (e.key === 'Enter' && document.activeElement.matches('tr[id]')) document.activeElement.click();
 });
+const sounds = [...document.querySelectorAll('details.sound')];
+const unfold = all => sounds.forEach(sound => { sound.open = all; });
+document.querySelectorAll('[data-sound]').forEach(b => b.addEventListener('click',
+  () => unfold(sounds.some(sound => !sound.open))));
+addEventListener('beforeprint', () => unfold(true));
 const boxes = [...document.querySelectorAll('.tools input')];
 function filter() {
   const shown = new Set(boxes.filter(b => b.checked).map(b => b.value));
-  rows.forEach(row => { row.hidden = !row.dataset.kinds.split(' ').some(kind => shown.has(kind)); });
+  const left = new Set();
+  rows.forEach(row => {
+    row.hidden = !row.dataset.kinds.split(' ').some(kind => shown.has(kind));
+    if (row.hidden) left.add(row.id);
+  });
+  marks.forEach(mark => mark.classList.toggle('off', left.has(mark.dataset.step)));
+  const note = document.querySelector('.left');
+  note.hidden = left.size === 0;
+  note.textContent = `Left out: ${boxes.filter(b => !b.checked).map(b => b.parentElement.innerText.trim()).join(', ')}. ` +
+    `${steps.filter(row => !row.hidden).length} of ${steps.length} steps are shown.`;
 }
 boxes.forEach(box => box.addEventListener('change', filter));
+show();
 document.querySelectorAll('[data-zoom]').forEach(b => b.addEventListener('click', () => zoom(+b.dataset.zoom)));
 document.querySelectorAll('a[href^="#s"]').forEach(a => a.addEventListener('click', e => {
   e.preventDefault(); choose(a.hash.slice(1), true); reveal(a.hash.slice(1)); }));

@@ -6,9 +6,12 @@
 #include "app/console/Wording.h"
 #include "app/notes/NotesWording.h"
 #include "app/notes/PdfPages.h"
+#include "app/notes/SoundWording.h"
 
 #include <algorithm>
+#include <array>
 #include <functional>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -25,8 +28,14 @@ constexpr double Margin = 42;
 constexpr double FootHeight = 22;
 constexpr double StripHeight = 14;
 constexpr double BandHeight = 84;
+constexpr double LineHeight = 10.5;
+/// A step with more lines goes on over the page.
+constexpr std::size_t MostLinesOfAPiece = 24;
+/// Of what stands above the rows of a reel that goes on from the page before.
+constexpr double ContinuedHeight = 30;
 
 constexpr PdfColour Ink{0.11, 0.12, 0.13};
+constexpr PdfColour White{1.0, 1.0, 1.0};
 constexpr PdfColour Dim{0.42, 0.45, 0.48};
 constexpr PdfColour Rule{0.85, 0.84, 0.82};
 constexpr PdfColour Kept{0.49, 0.58, 0.68};
@@ -35,26 +44,29 @@ constexpr PdfColour Moved{0.83, 0.54, 0.12, 0.7};
 constexpr PdfColour Doubled{0.54, 0.36, 0.75, 0.7};
 constexpr PdfColour Lifted{0.78, 0.27, 0.23};
 constexpr PdfColour Inserted{0.18, 0.58, 0.38};
+constexpr PdfColour Version{0.23, 0.47, 0.77};
 
 constexpr PdfFont TitleFont{"sans-serif", 19, true};
 constexpr PdfFont HeadingFont{"sans-serif", 12, true};
 constexpr PdfFont BodyFont{"sans-serif", 8.5};
 constexpr PdfFont SmallFont{"sans-serif", 7.5};
 constexpr PdfFont TimeFont{"monospace", 8};
+constexpr PdfFont ReelFont{"sans-serif", 6.5, true};
 constexpr PdfFont SmallTimeFont{"monospace", 7};
 
 /// What can't be broken over two pages.
 struct Piece {
     double height;
     std::function<void(PdfPages&, double top)> draw;
-    bool goesWithNext = false; ///< a heading
+    bool goesWithNext = false;       ///< a heading
+    std::optional<std::size_t> reel; ///< of whose rows it is one
 };
 
 class PdfForm {
 public:
     PdfForm(const NotesDocument& document, const NotesSink& sink)
         : m_document(document), m_words(document),
-          m_pages(document.isLetter ? 612.0 : 595.28, document.isLetter ? 792.0 : 841.89, sink)
+          m_pages(document.layout.isLetter ? 612.0 : 595.28, document.layout.isLetter ? 792.0 : 841.89, sink)
     {
         m_right = m_pages.width() - Margin;
         m_lengthRight = m_right - 78;
@@ -65,26 +77,36 @@ public:
         addHead();
         add(2 * StripHeight + BandHeight + 44, [this](PdfPages&, double top) { drawPicture(top); });
         addLargest();
+        addReels();
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
             addReel(reel);
+        addElsewhere();
         addRemarks();
         drawPages();
         m_pages.finish();
     }
 
 private:
+    using Lines = std::vector<std::pair<std::string, PdfColour>>;
+
     void add(double height, std::function<void(PdfPages&, double)> draw, bool goesWithNext = false)
     {
-        m_pieces.push_back({height, std::move(draw), goesWithNext});
+        m_pieces.push_back({height, std::move(draw), goesWithNext, {}});
     }
 
     void addText(const std::string& text, const PdfFont& font, const PdfColour& colour, double height,
                  bool goesWithNext = false)
     {
+        const std::vector<std::string> lines = m_pages.wrapped(text, font, m_right - Margin);
+        const double leading = font.size * 1.4;
         add(
-            height,
-            [this, text, font, colour, height](PdfPages& pages, double top) {
-                pages.text(Margin, top + height - 4, pages.fitting(text, font, m_right - Margin), font, colour);
+            height + static_cast<double>(lines.size() - 1) * leading,
+            [lines, font, colour, height, leading](PdfPages& pages, double top) {
+                double y = top + height - 4;
+                for (const std::string& line : lines) {
+                    pages.text(Margin, y, line, font, colour);
+                    y += leading;
+                }
             },
             goesWithNext);
     }
@@ -103,6 +125,10 @@ private:
         addText(concatenated({time(totals.lifted), " lifted, ", time(totals.inserted), " inserted, ",
                               time(totals.moved), " moved, ", time(totals.doubled), " doubled"}),
                 BodyFont, Ink, 13);
+        if (m_document.sound == nullptr)
+            return;
+        for (const std::string& total : SoundWording(*m_document.sound).totals())
+            addText("Sound: " + total, BodyFont, Ink, 13);
     }
 
     double xOf(std::int32_t frame) const
@@ -131,6 +157,7 @@ private:
         const double newTop = bandTop + BandHeight;
         m_pages.text(Margin, oldTop - 4, "old cut", SmallFont, Dim);
         m_pages.text(Margin, newTop + StripHeight + 10, "new cut", SmallFont, Dim);
+        drawLegend(newTop + StripHeight + 10);
         drawBox({0, m_document.notes.oldCut().length()}, oldTop, Kept);
         drawBox({0, m_document.notes.newCut().length()}, newTop, Kept);
         std::vector<FrameSpan> moves;
@@ -146,6 +173,40 @@ private:
                 for (const NoteEntry& entry : reel.entries)
                     drawEntry(entry, moves, drawsMoves, oldTop, newTop);
             }
+        }
+        if (m_document.notes.reels().size() > 1)
+            drawReelStarts(oldTop, newTop);
+    }
+
+    /// What the colours mean, up to the right margin.
+    void drawLegend(double y)
+    {
+        constexpr std::array Legend{std::pair{"kept", Kept},       std::pair{"moved", Moved},
+                                    std::pair{"doubled", Doubled}, std::pair{"lifted", Lifted},
+                                    std::pair{"new", Inserted},    std::pair{"new version", Version}};
+        double right = m_right;
+        for (auto entry = Legend.rbegin(); entry != Legend.rend(); ++entry) {
+            const auto& [word, colour] = *entry;
+            m_pages.textToRight(right, y, word, SmallFont, Dim);
+            right -= m_pages.widthOf(word, SmallFont) + 9;
+            m_pages.box(right, y - 6, 6, 6, colour);
+            right -= 10;
+        }
+    }
+
+    void drawReelStarts(double oldTop, double newTop)
+    {
+        const auto& reels = m_document.notes.reels();
+        const auto mark = [this](const core::Programme& cut, std::size_t place, std::size_t reel, double top) {
+            const double x = xOf(cut.reels()[place].start);
+            m_pages.box(x, top, 0.7, StripHeight, Ink);
+            m_pages.text(x + 2, top + 9.5, std::to_string(reel + 1), ReelFont, White);
+        };
+        for (std::size_t reel = 0; reel < reels.size(); ++reel) {
+            if (reels[reel].pair.oldReel)
+                mark(m_document.notes.oldCut(), *reels[reel].pair.oldReel, reel, oldTop);
+            if (reels[reel].pair.newReel)
+                mark(m_document.notes.newCut(), *reels[reel].pair.newReel, reel, newTop);
         }
     }
 
@@ -164,12 +225,12 @@ private:
             return;
         }
         const core::NoteStep& step = *entry.step();
-        if (!drawsMoves || step.action != core::StepAction::Replace)
+        if (!drawsMoves || step.action == core::StepAction::Move)
             return;
         for (const FrameSpan& removed : step.removedFrames)
             drawBox(removed, oldTop, Lifted);
         if (step.inserted.length > 0)
-            drawBox(step.inserted, newTop, Inserted);
+            drawBox(step.inserted, newTop, step.action == core::StepAction::Relabel ? Version : Inserted);
         for (const PictureChange& change : step.changes) {
             if (change.kind == core::ChangeKind::Doubled)
                 drawBand(*change.inOld, *change.inNew, bandTop, Doubled);
@@ -186,8 +247,35 @@ private:
         addText("The largest changes", HeadingFont, Ink, 24, true);
         for (const NoteEntry* const entry : steps) {
             addText(concatenated({"step ", std::to_string(entry->number), ": ", m_words.action(*entry), ", ",
-                                  m_words.describe(NotesWording::largestChange(*entry)).shot}),
+                                  m_words.shotsOf(*entry)}),
                     BodyFont, Ink, 12.5);
+            if (const core::StepSound* const sound = m_words.soundOf(*entry); sound != nullptr && !sound->isEmpty())
+                addText("        sound: " + SoundWording::shortSummary(*sound), SmallFont, Dim, 11);
+        }
+    }
+
+    /// A line a reel where there are several.
+    void addReels()
+    {
+        const auto& reels = m_document.notes.reels();
+        if (reels.size() < 2)
+            return;
+        addText("The reels", HeadingFont, Ink, 24, true);
+        const auto line = [this](const std::array<std::string, 6>& cells, const PdfFont& font,
+                                 const PdfColour& colour) {
+            add(11.5, [this, cells, font, colour](PdfPages& pages, double top) {
+                constexpr std::array Rights{24.0, 98.0, 172.0, 246.0, 324.0, 364.0};
+                for (std::size_t cell = 0; cell < cells.size(); ++cell)
+                    pages.textToRight(Margin + Rights[cell], top + 8.5, cells[cell], font, colour);
+            });
+        };
+        line({"reel", "begins", "before", "after", "change", "steps"}, SmallFont, Dim);
+        for (std::size_t reel = 0; reel < reels.size(); ++reel) {
+            const std::size_t steps = m_words.stepsOf(reel);
+            line({std::to_string(reel + 1), m_words.reelStart(reel), m_words.timecode(reels[reel].before),
+                  m_words.timecode(reels[reel].after), m_words.change(reels[reel].after - reels[reel].before),
+                  std::to_string(steps)},
+                 TimeFont, steps == 0 ? Dim : Ink);
         }
     }
 
@@ -196,19 +284,34 @@ private:
         addText(m_words.reelTitle(reel), HeadingFont, Ink, 32, true);
         addText(m_words.reelLengths(reel), BodyFont, Dim, 13, true);
         add(
-            18,
-            [this](PdfPages& pages, double top) {
-                const double y = top + 11;
-                pages.textToRight(Margin + 20, y, "step", SmallFont, Dim);
-                pages.text(Margin + 28, y, "at", SmallFont, Dim);
-                pages.text(Margin + 92, y, "what to do, and what changes", SmallFont, Dim);
-                pages.textToRight(m_lengthRight, y, "length", SmallFont, Dim);
-                pages.textToRight(m_right, y, "offset", SmallFont, Dim);
-                pages.box(Margin, top + 15, m_right - Margin, 0.5, Rule);
-            },
-            true);
+            18, [this](PdfPages&, double top) { drawColumnTitles(top); }, true);
+        const std::size_t first = m_pieces.size();
         for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
             addRow(entry, reel);
+        for (std::size_t piece = first; piece < m_pieces.size(); ++piece)
+            m_pieces[piece].reel = reel;
+        // No heading stands alone with what is kept at the start of the reel.
+        if (m_pieces.size() > first + 1)
+            m_pieces[first].goesWithNext = true;
+    }
+
+    void drawColumnTitles(double top)
+    {
+        const double y = top + 11;
+        m_pages.textToRight(Margin + 20, y, "step", SmallFont, Dim);
+        m_pages.text(Margin + 28, y, "at", SmallFont, Dim);
+        m_pages.text(Margin + 92, y, "what to do, and what changes", SmallFont, Dim);
+        m_pages.textToRight(m_lengthRight, y, "length", SmallFont, Dim);
+        m_pages.textToRight(m_right, y, "offset", SmallFont, Dim);
+        m_pages.box(Margin, top + 15, m_right - Margin, 0.5, Rule);
+    }
+
+    /// Above the rows of a reel that goes on from the page before.
+    void drawContinued(std::size_t reel)
+    {
+        m_pages.text(Margin, Margin + 8, concatenated({"Reel ", std::to_string(reel + 1), ", continued"}), SmallFont,
+                     Dim);
+        drawColumnTitles(Margin + 10);
     }
 
     void addRow(const NoteEntry& entry, std::size_t reel)
@@ -218,21 +321,37 @@ private:
                 [this, &entry, reel](PdfPages&, double top) { drawTimes(entry, reel, top + 8, SmallTimeFont, Dim); });
             return;
         }
-        const std::size_t lines = linesOf(entry).size();
-        add(static_cast<double>(lines) * 10.5 + 15, [this, &entry, reel](PdfPages& pages, double top) {
-            drawTimes(entry, reel, top + 10, TimeFont, Ink);
-            double y = top + 10;
-            for (const auto& [text, colour] : linesOf(entry)) {
-                y += 10.5;
-                pages.text(Margin + 92, y, pages.fitting(text, SmallFont, m_right - Margin - 92), SmallFont, colour);
-            }
-            pages.box(Margin, y + 4, m_right - Margin, 0.4, Rule);
-        });
+        const Lines lines = linesOf(entry);
+        for (std::size_t first = 0; first < lines.size(); first += MostLinesOfAPiece) {
+            const std::size_t end = std::min(lines.size(), first + MostLinesOfAPiece);
+            Lines piece(lines.begin() + static_cast<std::ptrdiff_t>(first),
+                        lines.begin() + static_cast<std::ptrdiff_t>(end));
+            const double head = first == 0 ? 10 : 0;
+            const double foot = end == lines.size() ? 5 : 0;
+            const double height = head + static_cast<double>(piece.size()) * LineHeight + foot;
+            add(height, [this, &entry, reel, head, foot, piece = std::move(piece)](PdfPages& pages, double top) {
+                if (head > 0)
+                    drawTimes(entry, reel, top + head, TimeFont, Ink);
+                const double bottom = drawLines(pages, piece, top + head);
+                if (foot > 0)
+                    pages.box(Margin, bottom + 4, m_right - Margin, 0.4, Rule);
+            });
+        }
     }
 
-    std::vector<std::pair<std::string, PdfColour>> linesOf(const NoteEntry& entry) const
+    /// Gives the base line of the last one.
+    double drawLines(PdfPages& pages, const Lines& lines, double y)
     {
-        std::vector<std::pair<std::string, PdfColour>> lines;
+        for (const auto& [text, colour] : lines) {
+            y += LineHeight;
+            pages.text(Margin + 92, y, pages.fitting(text, SmallFont, m_right - Margin - 92), SmallFont, colour);
+        }
+        return y;
+    }
+
+    Lines linesOf(const NoteEntry& entry) const
+    {
+        Lines lines;
         for (const PictureChange& change : entry.step()->changes) {
             const ChangeWords words = m_words.describe(change);
             lines.emplace_back(concatenated({words.shot, ": ", words.what, words.more.empty() ? "" : ", ", words.more}),
@@ -241,9 +360,36 @@ private:
         if (entry.step()->joined > 1)
             lines.emplace_back(
                 concatenated({"joined from ", std::to_string(entry.step()->joined), " trims that cancel out"}), Dim);
-        if (m_document.showsFeet)
+        if (m_document.layout.showsFeet)
             lines.emplace_back(m_words.inFeet(entry), Dim);
+        if (const core::StepSound* const sound = m_words.soundOf(entry))
+            addSound(*sound, lines);
         return lines;
+    }
+
+    void addSound(const core::StepSound& sound, Lines& lines) const
+    {
+        if (!sound.scenes.empty())
+            lines.emplace_back("scene: " + SoundWording::scenes(sound), Dim);
+        if (sound.isEmpty())
+            return;
+        const SoundWording words(*m_document.sound);
+        lines.emplace_back("sound: " + words.summary(sound), Ink);
+        for (const SoundLine& line : words.lines(sound))
+            lines.emplace_back(concatenated({"    ", line.time, "  ", line.name, ": ", line.what}), Dim);
+        if (const std::string rest = SoundWording::rest(sound); !rest.empty())
+            lines.emplace_back("    " + rest, Dim);
+    }
+
+    void addElsewhere()
+    {
+        if (m_document.sound == nullptr || m_document.sound->notes.elsewhere().isEmpty())
+            return;
+        addText(std::string(SoundWording::ElsewhereTitle), HeadingFont, Ink, 32, true);
+        Lines lines;
+        addSound(m_document.sound->notes.elsewhere(), lines);
+        for (const auto& [text, colour] : lines)
+            addText(text, SmallFont, colour, 10.5);
     }
 
     void drawTimes(const NoteEntry& entry, std::size_t reel, double y, const PdfFont& font, const PdfColour& colour)
@@ -280,7 +426,7 @@ private:
                 needed += m_pieces[next + 1].height;
             if (used > 0 && used + needed > room) {
                 ends.push_back(piece);
-                used = 0;
+                used = m_pieces[piece].reel ? ContinuedHeight : 0;
             }
             used += m_pieces[piece].height;
         }
@@ -292,11 +438,14 @@ private:
     {
         const std::vector<std::size_t> ends = pageEnds();
         const std::string cuts =
-            toPrintable(concatenated({joined(m_document.cuts.oldNames), " to ", joined(m_document.cuts.newNames)}))
-                .text;
+            toPrintable(concatenated({m_words.cutName(false), " to ", m_words.cutName(true)})).text;
         std::size_t piece = 0;
         for (std::size_t page = 0; page < ends.size(); ++page) {
             double top = Margin;
+            if (piece < m_pieces.size() && m_pieces[piece].reel) {
+                drawContinued(*m_pieces[piece].reel);
+                top += ContinuedHeight;
+            }
             for (; piece < ends[page]; ++piece) {
                 m_pieces[piece].draw(m_pages, top);
                 top += m_pieces[piece].height;

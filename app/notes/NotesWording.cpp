@@ -5,7 +5,9 @@
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
 #include "app/edl/GenerationReport.h"
+#include "app/edl/ScreenTimecode.h"
 #include "core/edl/EventBase.h"
+#include "core/edl/MatchedName.h"
 #include "core/time/Timecode.h"
 
 #include <algorithm>
@@ -30,22 +32,19 @@ namespace {
 
 constexpr std::int32_t FramesPerFoot = 16;
 constexpr std::size_t MostCharactersOfAName = 39;
-/// So many events with the same doubt are named.
-constexpr std::size_t MostOfOneDoubt = 5;
+/// The files of a cut are named one by one up to so many.
+constexpr std::size_t MostFilesNamed = 3;
+/// So many events with the same doubt are named, and so many lines that were not read.
+constexpr std::size_t MostOfAKind = 5;
 
 constexpr std::array<std::string_view, 12> KindWords{
     "head-trimmed", "tail-trimmed", "lifted",          "inserted",         "replaced",           "moved",
     "doubled",      "retimed",      "version-changed", "transition-added", "transition-removed", "transition-changed"};
 constexpr std::array<std::string_view, 3> ActionWords{"replace", "move", "relabel"};
 constexpr std::array<std::string_view, 5> DoubtWords{"no-picture", "flawed", "reversed", "nameless", "covered"};
-constexpr std::array<std::string_view, 13> FlawWords{
-    "timecode-uninitialized", "free-text",        "event-number-not-numeric", "roll-name-invalid",  "not-video-event",
-    "transition-duration",    "transition-type",  "src-in-unreadable",        "src-out-unreadable", "dst-in-unreadable",
-    "dst-out-unreadable",     "timecode-invalid", "timecode-range-invalid"};
 static_assert(static_cast<std::size_t>(ChangeKind::TransitionChanged) + 1 == KindWords.size());
 static_assert(static_cast<std::size_t>(StepAction::Relabel) + 1 == ActionWords.size());
 static_assert(static_cast<std::size_t>(PictureDoubt::Covered) + 1 == DoubtWords.size());
-static_assert(core::EventFlaw::Last + 1 == FlawWords.size());
 
 /// "-20 frames", "+1 frame".
 std::string signedFrames(std::int32_t frames)
@@ -92,11 +91,6 @@ std::string_view wordOf(PictureDoubt doubt)
     return DoubtWords.at(static_cast<std::size_t>(doubt));
 }
 
-std::string_view wordOfFlaw(std::int32_t flaw)
-{
-    return FlawWords.at(static_cast<std::size_t>(flaw));
-}
-
 std::string concatenated(std::initializer_list<std::string_view> texts)
 {
     std::string all;
@@ -105,12 +99,17 @@ std::string concatenated(std::initializer_list<std::string_view> texts)
     return all;
 }
 
-std::string NotesWording::timecode(std::int32_t frames) const
+std::string NotesWording::plainTimecode(std::int32_t frames) const
 {
     const core::Framerate& framerate = m_document.notes.framerate();
     Timecode timecode;
     timecode.setFrameCount(frames % (framerate.lastFrame + 1), framerate);
     return timecode.toString();
+}
+
+std::string NotesWording::timecode(std::int32_t frames) const
+{
+    return onScreen(plainTimecode(frames), m_document.notes.framerate());
 }
 
 std::string NotesWording::change(std::int32_t frames) const
@@ -143,7 +142,9 @@ std::string NotesWording::action(const NoteEntry& entry) const
     const NoteStep& step = *entry.step();
     switch (step.action) {
     case StepAction::Move: {
-        const bool goesFurtherOn = step.from.reel == step.place.reel && step.from.frame < step.place.frame;
+        // Between reels the row stands in the one that loses or wins the picture.
+        const bool goesFurtherOn =
+            step.from.reel == step.place.reel ? step.from.frame < step.place.frame : entry.lengthChange < 0;
         const WorkPlace& other = goesFurtherOn ? step.place : step.from;
         return "move " + timecode(step.moved) + (goesFurtherOn ? " to " : " from ") +
                timecode(m_document.notes.timecodeOf(other));
@@ -208,6 +209,12 @@ std::string NotesWording::transitionText(const PictureChange& change) const
     return type + lengthOf(change.oldShot) + " now " + lengthOf(change.newShot) + " frames";
 }
 
+/// The name in which its version stands.
+std::string NotesWording::versionName(const EventBase* shot) const
+{
+    return shot == nullptr ? std::string() : core::nameBy(m_document.matchBy, *shot);
+}
+
 ChangeWords NotesWording::describe(const PictureChange& change) const
 {
     const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
@@ -224,7 +231,8 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     case ChangeKind::Inserted: {
         std::string more;
         if (shot != nullptr)
-            more = "roll " + toPrintable(shot->rollName(), 40).text + ", source " + shot->srcIn().toString();
+            more = "roll " + toPrintable(shot->rollName(), 40).text + ", source " +
+                   onScreen(shot->srcIn().toString(), m_document.notes.framerate());
         return {"inserted " + length, name, more};
     }
     case ChangeKind::Replaced:
@@ -242,8 +250,8 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
                 name,
                 {}};
     case ChangeKind::VersionChanged:
-        return {"was " + toPrintable(change.oldShot == nullptr ? "" : change.oldShot->rollName(), 28).text,
-                toPrintable(shot == nullptr ? "" : shot->rollName(), MostCharactersOfAName).text,
+        return {"was " + toPrintable(versionName(change.oldShot), 28).text,
+                toPrintable(versionName(change.newShot), MostCharactersOfAName).text,
                 {}};
     case ChangeKind::TransitionAdded:
     case ChangeKind::TransitionRemoved:
@@ -268,11 +276,46 @@ std::string NotesWording::reelTitle(std::size_t reel) const
     return oldStart == start ? title : title + ", began at " + timecode(oldStart);
 }
 
+std::string NotesWording::reelStart(std::size_t reel) const
+{
+    const auto& notes = m_document.notes;
+    const core::ReelChange& pair = notes.reels()[reel].pair;
+    return timecode(pair.newReel ? notes.newCut().reels()[*pair.newReel].timecodeStart
+                                 : notes.oldCut().reels()[*pair.oldReel].timecodeStart);
+}
+
 std::string NotesWording::reelLengths(std::size_t reel) const
 {
     const core::ReelNotes& notes = m_document.notes.reels()[reel];
+    if (notes.before == notes.after)
+        return timecode(notes.before) + " before and after" + (stepsOf(reel) == 0 ? ", nothing has changed" : "");
     return timecode(notes.before) + " before, " + timecode(notes.after) + " after, " +
            change(notes.after - notes.before);
+}
+
+std::size_t NotesWording::stepsOf(std::size_t reel) const
+{
+    const auto& entries = m_document.notes.reels()[reel].entries;
+    return static_cast<std::size_t>(
+        std::count_if(entries.begin(), entries.end(), [](const NoteEntry& entry) { return entry.step() != nullptr; }));
+}
+
+std::string NotesWording::shotsOf(const NoteEntry& entry) const
+{
+    const std::size_t more = entry.step()->changes.size() - 1;
+    const std::string shot = describe(largestChange(entry)).shot;
+    if (more == 0)
+        return shot;
+    const std::string text = concatenated({" and ", std::to_string(more), " more"});
+    return toPrintable(shot, MostCharactersOfAName - text.size()).text + text;
+}
+
+std::string NotesWording::cutName(bool isNew) const
+{
+    const std::vector<std::string>& names = isNew ? m_document.cuts.newNames : m_document.cuts.oldNames;
+    if (names.size() <= MostFilesNamed)
+        return joined(names);
+    return concatenated({names.front(), " ... ", names.back(), " (", std::to_string(names.size()), " files)"});
 }
 
 std::vector<std::string> NotesWording::remarks() const
@@ -287,10 +330,36 @@ std::vector<std::string> NotesWording::remarks() const
     }
     if (const std::size_t joined = m_document.notes.joinedSteps(); joined > 0)
         lines.push_back(std::to_string(joined) + " trims that cancel out within " +
-                        counted(static_cast<std::size_t>(m_document.simplify), "frame") + " are joined");
-    addDoubts(false, lines);
-    addDoubts(true, lines);
+                        counted(static_cast<std::size_t>(m_document.layout.simplify), "frame") + " are joined");
+    for (const bool isNew : {false, true}) {
+        addDoubts(isNew, lines);
+        addUnread(isNew, lines);
+    }
+    if (m_document.sound != nullptr)
+        lines.insert(lines.end(), m_document.sound->remarks.begin(), m_document.sound->remarks.end());
     return lines;
+}
+
+const core::StepSound* NotesWording::soundOf(const NoteEntry& entry) const
+{
+    return m_document.sound == nullptr || entry.step() == nullptr ? nullptr : &m_document.sound->notes.at(entry.number);
+}
+
+void NotesWording::addUnread(bool isNew, std::vector<std::string>& lines) const
+{
+    const std::vector<UnreadOfFile>& unread = isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread;
+    std::size_t count = 0;
+    for (const auto& [file, unreadLines] : unread) {
+        for (const auto& [line, problem] : unreadLines) {
+            if (++count <= MostOfAKind)
+                lines.push_back(
+                    concatenated({toPrintable(file, MostCharactersOfAName).text, ", line ", std::to_string(line.number),
+                                  " ", problem, ": \"", toPrintable(line.text, MostCharactersOfAName).text, "\""}));
+        }
+    }
+    if (count > MostOfAKind)
+        lines.push_back(concatenated(
+            {isNew ? "New cut, " : "Old cut, ", counted(count - MostOfAKind, "further line"), " not read"}));
 }
 
 void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
@@ -299,23 +368,22 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
     std::array<std::size_t, DoubtWords.size()> counts{};
     for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
         const EventBase& event = cut.events().at(static_cast<std::size_t>(doubtful.event));
-        if (++counts.at(static_cast<std::size_t>(doubtful.doubt)) <= MostOfOneDoubt)
+        if (++counts.at(static_cast<std::size_t>(doubtful.doubt)) <= MostOfAKind)
             lines.push_back(concatenated({toPrintable(event.edlFileName(), MostCharactersOfAName).text, ", event ",
                                           std::to_string(event.eventNumber()), " (", nameOf(&event),
                                           "): ", explanationOf(doubtful.doubt)}));
     }
     for (std::size_t doubt = 0; doubt < counts.size(); ++doubt) {
-        if (counts[doubt] > MostOfOneDoubt)
-            lines.push_back(concatenated({isNew ? "New cut, " : "Old cut, ",
-                                          counted(counts[doubt] - MostOfOneDoubt, "further event"), ": ",
-                                          explanationOf(static_cast<PictureDoubt>(doubt))}));
+        if (counts[doubt] > MostOfAKind)
+            lines.push_back(
+                concatenated({isNew ? "New cut, " : "Old cut, ", counted(counts[doubt] - MostOfAKind, "further event"),
+                              ": ", explanationOf(static_cast<PictureDoubt>(doubt))}));
     }
 }
 
 std::string NotesWording::cutText(bool isNew) const
 {
-    return describeEvents(isNew ? m_document.newEvents : m_document.oldEvents,
-                          isNew ? m_document.cuts.newNames : m_document.cuts.oldNames,
+    return describeEvents(isNew ? m_document.newEvents : m_document.oldEvents, {cutName(isNew)},
                           countOf(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread));
 }
 

@@ -12,11 +12,10 @@
 
 namespace cadrel::app {
 
-/// The words for a ChangeKind, a StepAction, a PictureDoubt and an EventFlaw in files for other programs.
+/// The words for a ChangeKind, a StepAction and a PictureDoubt in files for other programs.
 std::string_view wordOf(core::ChangeKind kind);
 std::string_view wordOf(core::StepAction action);
 std::string_view wordOf(core::PictureDoubt doubt);
-std::string_view wordOfFlaw(std::int32_t flaw);
 
 /// The texts one after the other.
 std::string concatenated(std::initializer_list<std::string_view> texts);
@@ -33,8 +32,11 @@ class NotesWording {
 public:
     explicit NotesWording(const NotesDocument& document) : m_document(document) {}
 
-    /// Of a frame count. It begins anew after 24 hours, which a reel may reach on its way to a shorter one.
+    /// Of a frame count. It begins anew after 24 hours, which a reel may reach on its way to a shorter one. Drop-frame shows
+    /// in a ";".
     std::string timecode(std::int32_t frames) const;
+    /// The same for other programs, always with ":".
+    std::string plainTimecode(std::int32_t frames) const;
     /// A length with its sign.
     std::string change(std::int32_t frames) const;
     /// 35 mm feet and frames, 16 frames a foot: "12+05". The first frame of a reel is 0+00.
@@ -51,21 +53,34 @@ public:
     std::string inFeet(const core::NoteEntry& entry) const;
     /// "Reel 1, 03:00:00:00".
     std::string reelTitle(std::size_t reel) const;
+    /// Where it begins in the new cut, or in the old one where it is gone.
+    std::string reelStart(std::size_t reel) const;
     /// "00:15:30:21 before, 00:15:07:20 after, -00:00:23:01".
     std::string reelLengths(std::size_t reel) const;
     /// What was healed, joined, doubted and passed over, a line each.
     std::vector<std::string> remarks() const;
+    /// The names of the files of a cut; of many the first and the last.
+    std::string cutName(bool isNew) const;
+    /// How many steps a reel has.
+    std::size_t stepsOf(std::size_t reel) const;
+    /// The largest change of a step, and how many more there are: "42A-3 MAREN MCU and 2 more".
+    std::string shotsOf(const core::NoteEntry& entry) const;
     /// The names of the files of a cut, its number of events and of flawed ones.
     std::string cutText(bool isNew) const;
 
     /// The clip's name, or the roll's where it has none; "no picture" for a gap.
     static std::string nameOf(const core::EventBase* shot);
 
+    /// What a run has done to the sound at a step; null where the notes are only about the picture.
+    const core::StepSound* soundOf(const core::NoteEntry& entry) const;
+
     const NotesDocument& document() const { return m_document; }
 
 private:
+    std::string versionName(const core::EventBase* shot) const;
     std::string transitionText(const core::PictureChange& change) const;
     void addDoubts(bool isNew, std::vector<std::string>& lines) const;
+    void addUnread(bool isNew, std::vector<std::string>& lines) const;
 
     const NotesDocument& m_document;
 };

@@ -3,6 +3,7 @@
 #include "app/project/ProjectAccess.h"
 
 #include "app/console/Paths.h"
+#include "host/project/HostFramerate.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 #include "util/Result.h"
@@ -47,15 +48,10 @@ Failure writingFailure(const ProjectFileError& error, const std::string& file)
     return fault == "can't be written" ? unwritable({file}) : Failure{file, fault, "correct the project"};
 }
 
-Failure changedFailure(const standin::ProjectFileChanged& error, const std::string& file)
-{
-    return {file, faultIn(error, file), "look at what it has written, and run again"};
-}
-
 ProjectClock clockOf(const standin::Project& project, const std::string& file)
 {
     try {
-        return {project.frameRate(), project.timeOrigin()};
+        return {host::framerateOf(project.frameRate()), project.timeOrigin()};
     } catch (const util::Result::Type&) {
         throw Failure{file, "has a frame rate at which no timecode counts", "correct the rate"};
     }

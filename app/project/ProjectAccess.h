@@ -3,7 +3,7 @@
 #pragma once
 
 #include "app/console/Failure.h"
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 #include "app/settings/SettingsReport.h"
 
 #include <string>
@@ -22,7 +22,6 @@ void requireReadableProject(const std::string& file);
 /// What an error in reading or writing a project file means for the user.
 Failure readingFailure(const standin::ProjectFileError& error, const std::string& file);
 Failure writingFailure(const standin::ProjectFileError& error, const std::string& file);
-Failure changedFailure(const standin::ProjectFileChanged& error, const std::string& file);
 
 /// Throws Failure for a project with a rate at which there is no timecode.
 ProjectClock clockOf(const standin::Project& project, const std::string& file);

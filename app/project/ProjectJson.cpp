@@ -22,6 +22,8 @@ using standin::Track;
 
 namespace {
 
+constexpr int Schema = 1;
+
 std::string textOf(const ordered_json& value)
 {
     return value.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
@@ -91,6 +93,7 @@ void ProjectJson::write(const std::string& fileName, const Tracks& tracks) const
     const Velmark::FrameRateInfo rate = m_project.frameRate();
     using Flag = Velmark::FrameRateInfo::Flag;
     const ordered_json facts{
+        {"schema", Schema},
         {"file", fileName},
         {"name", toUtf8(m_project.name())},
         {"frameRate",

@@ -10,8 +10,8 @@
 #include "app/console/Replacing.h"
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
+#include "app/edl/ProjectClock.h"
 #include "app/project/ProjectAccess.h"
-#include "app/project/ProjectClock.h"
 #include "app/project/ProjectContent.h"
 #include "app/project/ProjectJson.h"
 #include "app/project/ProjectListing.h"
@@ -96,7 +96,7 @@ void writeJson(Project& project, const ProjectClock& clock, const StoredModel& s
     std::optional<Interruption> interruption;
     if (!Output::isStandardOutput(options.jsonFile))
         interruption.emplace();
-    Output json(options.jsonFile);
+    Output json(options.jsonFile, options.isReplacing);
     ProjectJson(project, clock, stored, [&json](std::string_view text) {
         json.write(text);
     }).write(fileNameOf(options.projectFile), tracks);

@@ -155,11 +155,19 @@ void FileReplacement::finish()
         throw Result::FileAccessFailed;
 }
 
-void FileReplacement::putInPlace()
+void FileReplacement::requireUnchanged(const FileStamp& expected) const
+{
+    if (!m_target.empty() && FileStamp::of(m_target) != expected)
+        throw TargetChanged{};
+}
+
+void FileReplacement::putInPlace(const std::optional<FileStamp>& expected)
 {
     finish();
     if (m_target.empty())
         return;
+    if (expected)
+        requireUnchanged(*expected);
     std::error_code error;
     if (fs::is_regular_file(m_target, error)) {
         // With a second name, the former file keeps its place until the new one takes it. Some disks don't support
@@ -191,8 +199,8 @@ void FileReplacement::commit(const std::optional<FileStamp>& expected)
     finish();
     if (m_target.empty())
         return;
-    if (expected && FileStamp::of(m_target) != *expected)
-        throw TargetChanged{};
+    if (expected)
+        requireUnchanged(*expected);
     moveToTarget();
     syncFolderOf(m_target);
 }

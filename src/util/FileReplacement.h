@@ -29,7 +29,7 @@ namespace cadrel::util {
 /// Without `keep`, the destructor restores the former files.
 class FileReplacement {
 public:
-    /// Thrown by `commit`.
+    /// Thrown where another program has written the target.
     struct TargetChanged {};
 
     /// Throws Result::FileAccessFailed when the target can't be written, as for a folder or a write-protected file.
@@ -43,16 +43,19 @@ public:
     void write(std::string_view text);
     /// Ends the writing; then the content is on the disk. Throws Result::FileAccessFailed when not all could be written.
     void finish();
-    /// Moves the former file aside and the finished one to its place. Throws Result::FileAccessFailed.
-    void putInPlace();
+    /// Throws TargetChanged when the target isn't as it was at the time of the stamp. A target that is written directly
+    /// isn't looked at.
+    void requireUnchanged(const FileStamp& expected) const;
+    /// Moves the former file aside and the finished one to its place. Throws Result::FileAccessFailed; with an `expected`
+    /// stamp, as requireUnchanged.
+    void putInPlace(const std::optional<FileStamp>& expected = std::nullopt);
     /// Makes the replacement final and drops the former file.
     void keep();
 
     /// Finishes the file and replaces the former one in one step, so that the target exists at every moment. Throws
     /// Result::FileAccessFailed. The new file is in place nevertheless if the disk fails in the very last step.
     ///
-    /// With an `expected` stamp, the target has to be as it was then: TargetChanged is thrown, and the target stays, if
-    /// another program has written it since. A target that is written directly isn't looked at.
+    /// With an `expected` stamp, throws as requireUnchanged, and the target stays.
     void commit(const std::optional<FileStamp>& expected = std::nullopt);
 
 private:

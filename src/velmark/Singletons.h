@@ -24,7 +24,6 @@ public:
     bool add(FObject* singleton);
     /// Releases them all; this also happens at the end of the process. A second call does nothing.
     void shutDown();
-    bool hasShutDownBegun() const { return m_shuttingDown; }
 
 private:
     TArray<FObject*> m_objects{10};

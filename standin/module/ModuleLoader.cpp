@@ -21,9 +21,9 @@ constexpr std::string_view ServiceCategory = "Service";
 } // namespace
 
 ModuleLoader::ModuleLoader(Application& application, const std::filesystem::path& module,
-                           const std::filesystem::path& resources)
-    : m_application(application), m_file(std::filesystem::absolute(module)),
-      m_resources(std::filesystem::absolute(resources).string())
+                           const std::filesystem::path& resources, IHostContext* context)
+    : m_application(application), m_context(context ? context : application.context()),
+      m_file(std::filesystem::absolute(module)), m_resources(std::filesystem::absolute(resources).string())
 {
     try {
         load();
@@ -55,7 +55,7 @@ void ModuleLoader::load()
     if (m_factory->createInstance(serviceClass(), IPluginBase::iid, reinterpret_cast<void**>(m_controller.out())) !=
         ResultOk)
         fail("the module can't make its object");
-    m_isInitialised = m_controller->initialize(m_application.context()) == ResultOk;
+    m_isInitialised = m_controller->initialize(m_context) == ResultOk;
     if (!m_isInitialised)
         fail("the module doesn't work in this host");
 }

@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "velmark/Context.h"
 #include "velmark/Counted.h"
 #include "velmark/Module.h"
 #include "velmark/PluginFactory.h"
@@ -27,8 +28,10 @@ public:
 class ModuleLoader {
 public:
     /// Loads the shared object and initialises the object of its class "Service". `resources` is the folder with the
-    /// module's files. The application outlives the loader. Throws ModuleError; nothing stays loaded then.
-    ModuleLoader(Application& application, const std::filesystem::path& module, const std::filesystem::path& resources);
+    /// module's files. The application outlives the loader, and so does `context`, which the module is given in the place of
+    /// the application's own unless it is null. Throws ModuleError; nothing stays loaded then.
+    ModuleLoader(Application& application, const std::filesystem::path& module, const std::filesystem::path& resources,
+                 Velmark::IHostContext* context = nullptr);
     ModuleLoader(const ModuleLoader&) = delete;
     ModuleLoader& operator=(const ModuleLoader&) = delete;
     /// The undo lists of all open projects are dropped, because they hold steps of the module.
@@ -46,6 +49,7 @@ private:
     [[noreturn]] void fail(const std::string& reason) const;
 
     Application& m_application;
+    Velmark::IHostContext* m_context;
     std::filesystem::path m_file;
     std::string m_resources; ///< the bundle handle is its text
     void* m_object = nullptr;

@@ -8,6 +8,7 @@
 #include "velmark/Module.h"
 
 #include <cstddef>
+#include <vector>
 
 namespace standin {
 
@@ -24,6 +25,8 @@ public:
     Velmark::int32 setIdleBlocked(bool blocked) override;
 
     bool isBlocked() const { return m_blocks > 0; }
+    /// In the order in which they came.
+    const std::vector<Velmark::IIdleHandler*>& handlers() const { return m_handlers.all(); }
     /// Calls the handlers in the order in which they came, until one blocks the idle calls.
     void callHandlers();
 

@@ -33,16 +33,22 @@ HostWindow::~HostWindow() = default;
 
 int32 HostWindow::open()
 {
-    if (m_native || !m_view || m_view->isPlatformTypeSupported(m_windows.parentType()) != ResultOk)
+    const auto self = Counted<HostWindow>::share(this);
+    const Counted<IPlugView> view = m_view;
+    if (m_native || !view || view->isPlatformTypeSupported(m_windows.parentType()) != ResultOk)
         return ResultFalse;
     ViewRect rect;
-    m_view->getSize(rect);
+    view->getSize(rect);
     m_native = m_windows.createWindow(m_description.title, widthOf(rect), heightOf(rect), *this);
+    if (m_native)
+        view->setFrame(this);
     if (!m_native)
         return ResultFalse;
-    m_view->setFrame(this);
-    if (m_view->attached(m_native->parent(), m_windows.parentType()) != ResultOk) {
-        m_view->setFrame(nullptr);
+    const bool isAttached = view->attached(m_native->parent(), m_windows.parentType()) == ResultOk;
+    if (!m_native)
+        return ResultFalse;
+    if (!isAttached) {
+        view->setFrame(nullptr);
         m_native.reset();
         return ResultFalse;
     }
@@ -74,10 +80,13 @@ void HostWindow::close()
         return;
     // Whoever is told may give back the last reference.
     const auto self = Counted<HostWindow>::share(this);
-    m_view->removed();
-    m_view->setFrame(nullptr);
-    m_view.reset();
-    m_native.reset();
+    // Taken out first, so that a view that closes the window once more finds it closed.
+    std::unique_ptr<NativeWindow> native = std::move(m_native);
+    Counted<IPlugView> view = std::exchange(m_view, nullptr);
+    view->removed();
+    view->setFrame(nullptr);
+    view.reset();
+    native.reset();
     if (ICloseWindowNotification* const listener = std::exchange(m_listener, nullptr))
         listener->windowClosed(this);
     m_changed(*this, false);
@@ -94,7 +103,10 @@ int32 HostWindow::resizeView(IPlugView* view, const ViewRect& rect)
 
 void HostWindow::resizedByUser(int32 width, int32 height)
 {
+    const auto self = Counted<HostWindow>::share(this);
     const Counted<IPlugView> view = m_view;
+    if (!view)
+        return;
     ViewRect rect{0, 0, width, height};
     if (view->canResize() == 0)
         view->getSize(rect);
@@ -109,13 +121,14 @@ void HostWindow::resizedByUser(int32 width, int32 height)
 
 void HostWindow::focusChanged(bool hasFocus)
 {
-    Counted<IPlugView>(m_view)->onFocus(hasFocus);
+    if (const Counted<IPlugView> view = m_view)
+        view->onFocus(hasFocus);
 }
 
 void HostWindow::idle()
 {
-    if (m_view && m_native)
-        Counted<IPlugView>(m_view)->idle();
+    if (const Counted<IPlugView> view = m_view; view && m_native)
+        view->idle();
 }
 
 } // namespace standin

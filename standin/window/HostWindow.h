@@ -21,7 +21,7 @@ class HostWindow : public Velmark::Implements<HostWindow, Velmark::FObject, Velm
 public:
     static constexpr const char* ClassName = "HostWindow";
 
-    /// `changed` is called with true when the window has come on the screen, and with false when it has gone.
+    /// `changed` is called with true when the window has come on the screen, and with false when it has been closed.
     using Changed = std::function<void(HostWindow&, bool isOpen)>;
 
     /// The window system outlives the window.
@@ -29,7 +29,8 @@ public:
                Changed changed);
     ~HostWindow() override;
 
-    /// Fails when the view can't be shown by this window system or refuses its parent, and when it was open before.
+    /// Fails when the view can't be shown by this window system, refuses its parent or closes the window meanwhile, and when
+    /// it was open before.
     Velmark::int32 open() override;
     Velmark::int32 setCloseNotification(Velmark::ICloseWindowNotification* listener) override;
     Velmark::int32 show(bool visible) override;
@@ -45,7 +46,7 @@ public:
     Velmark::IPlugView* view() const { return m_view.get(); }
 
 private:
-    // The view may close the window in each of its calls.
+    // The view may close the window in each of its calls, and with it give back the last reference.
     void resizedByUser(std::int32_t width, std::int32_t height) override;
     void closedByUser() override { close(); }
     void focusChanged(bool hasFocus) override;

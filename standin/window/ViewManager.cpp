@@ -59,8 +59,10 @@ void ViewManager::idle()
 
 void ViewManager::closeAll()
 {
-    while (!m_open.empty())
-        Counted<HostWindow>(m_open.back())->show(false);
+    // One that is being closed already stays until that is done.
+    const std::vector<Counted<HostWindow>> open = m_open;
+    for (const Counted<HostWindow>& window : open)
+        window->show(false);
 }
 
 } // namespace standin

@@ -2,6 +2,8 @@
 
 #pragma once
 
+#include <array>
+#include <cstdio>
 #include <string>
 
 namespace cadrel::tests {
@@ -40,6 +42,24 @@ inline std::string newCut()
            cut("002", "A002", "11:00:02:12 11:00:10:12", "01:00:10:00 01:00:18:00") + clipName("TWO") +
            cut("003", "B009", "05:00:00:00 05:00:04:00", "01:00:18:00 01:00:22:00") + clipName("NEW") +
            cut("004", "A003", "12:00:00:00 12:00:10:00", "01:00:22:00 01:00:32:00") + clipName("THREE");
+}
+
+/// The timecode so many seconds after 01:00:00:00.
+inline std::string secondsOn(int seconds)
+{
+    std::array<char, 16> text{};
+    std::snprintf(text.data(), text.size(), "%02d:%02d:%02d:00", 1 + seconds / 3600, seconds / 60 % 60, seconds % 60);
+    return text.data();
+}
+
+/// So many shots of one second, each on a roll of its own.
+inline std::string manyShots(int count)
+{
+    std::string text;
+    for (int shot = 0; shot < count; ++shot)
+        text += cut("001", std::string("R").append(std::to_string(shot)), "10:00:00:12 10:00:01:12",
+                    secondsOn(shot) + " " + secondsOn(shot + 1));
+    return text;
 }
 
 } // namespace cadrel::tests

@@ -6,6 +6,7 @@
 
 #include <array>
 #include <cstdio>
+#include <filesystem>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
@@ -50,26 +51,6 @@ std::vector<std::string> timesOf(const json& events)
         times.push_back(text("srcIn") + "-" + text("srcOut") + ">" + text("dstIn") + "-" + text("dstOut"));
     }
     return times;
-}
-
-/// `seconds` after 01:00:00:00.
-std::string at(int seconds)
-{
-    std::array<char, 16> text{};
-    std::snprintf(text.data(), text.size(), "%02d:%02d:%02d:00", 1 + seconds / 3600, seconds / 60 % 60, seconds % 60);
-    return text.data();
-}
-
-/// Shots of a second each, one after the other; frame 12 shows that there are 24.
-std::string manyShots(int count)
-{
-    std::string text;
-    for (int shot = 0; shot < count; ++shot) {
-        std::string roll = "R";
-        roll += std::to_string(shot);
-        text += cut("001", roll, "10:00:00:12 10:00:01:12", at(shot) + " " + at(shot + 1));
-    }
-    return text;
 }
 
 TEST(Generate, WritesTheChangeEdl)
@@ -145,8 +126,8 @@ TEST(Generate, JsonTellsTheEventsAndTheSummary)
     const json document = film.generateAsJson({"-o", film.folder / "change.edl"});
 
     ASSERT_EQ(document.at("events").size(), 3U);
-    EXPECT_EQ(document.at("events").at(1), json::parse(R"({"number": 2, "kind": 0, "roll": "A002",
-        "clip": "TWO", "transition": 0, "duration": 0, "srcIn": "01:00:12:00", "srcOut": "01:00:20:00",
+    EXPECT_EQ(document.at("events").at(1), json::parse(R"({"number": 2, "kind": "plain", "roll": "A002",
+        "clip": "TWO", "transition": "cut", "duration": 0, "srcIn": "01:00:12:00", "srcOut": "01:00:20:00",
         "dstIn": "01:00:10:00", "dstOut": "01:00:18:00", "speed": 1.0, "vfx": false, "flaws": [], "edlFile": "",
         "members": []})"));
     EXPECT_EQ(document.at("rate"), "24 fps");
@@ -168,7 +149,7 @@ TEST(Generate, TouchingNeighboursAreHealed)
     ASSERT_EQ(timesOf(document.at("events")),
               (std::vector<std::string>{"01:00:00:00-01:00:30:00>01:00:00:00-01:00:30:00"}));
     const json& healed = document.at("events").at(0);
-    EXPECT_EQ(healed.at("kind"), 1);
+    EXPECT_EQ(healed.at("kind"), "healed");
     EXPECT_EQ(healed.at("roll"), "Healed Event 001");
     EXPECT_EQ(timesOf(healed.at("members")),
               (std::vector<std::string>{"01:00:00:00-01:00:10:00>01:00:00:00-01:00:10:00",
@@ -396,6 +377,33 @@ TEST(Generate, AllButAFrameIsNotAHundredPercent)
     EXPECT_NE(film.generate().out.find("Covered     00:06:39:23 of 00:06:40:00, 99.9 %\n"), std::string::npos);
 }
 
+TEST(Generate, AFileThatComesUpDuringTheRunIsNotOverwritten)
+{
+    const Film film(manyShots(20000), manyShots(20000));
+    const auto run = [&](const std::string& appearing, const std::vector<std::string>& more) {
+        std::vector<std::string> words{"generate", "--old", film.oldFile, "--new", film.newFile};
+        words.insert(words.end(), more.begin(), more.end());
+        return runCadrelDisturbedAt("reading new.edl", words,
+                                    [&] { film.folder.write(appearing, "of another program"); });
+    };
+    const std::string change = film.folder / "change.edl";
+    const std::string document = film.folder / "change.json";
+    const std::vector<std::string> inputs{"new.edl", "old.edl"};
+    const auto requireKept = [&](const Outcome& outcome, const std::string& name) {
+        EXPECT_EQ(outcome.status, 1);
+        EXPECT_NE(outcome.out.find(name + ": exists already; give --overwrite"), std::string::npos) << outcome.out;
+        EXPECT_EQ(contentOf(film.folder / name), "of another program");
+        EXPECT_EQ(film.folder.names().size(), inputs.size() + 1);
+        std::filesystem::remove(film.folder / name);
+    };
+
+    requireKept(run("change.edl", {"-o", change, "--json", document}), "change.edl");
+    requireKept(run("change.json", {"-o", change, "--json", document}), "change.json");
+    requireKept(run("change_2.edl", {"-o", change, "--heal", "none"}), "change_2.edl");
+    EXPECT_EQ(run("change.edl", {"-o", change, "--overwrite"}).status, 0);
+    EXPECT_NE(contentOf(change), "of another program");
+}
+
 const std::string OutsideOfTheDay = ": a time would fall outside the 24 hours of a day";
 const std::string CorrectTimecodes = "; correct its timecodes or leave it out\n";
 
@@ -431,15 +439,17 @@ TEST(Generate, AnEventThatCantBeUsedIsToldAndPassedOver)
     const std::string late = "003  A008  V  D  024  01:00:00:00 01:00:00:12 23:59:59:12 23:59:59:23\n";
     const std::string fine = cut("001", "A001", "10:00:00:00 10:00:10:12", "01:00:00:00 01:00:10:12");
     const Film film(fine + endless, fine + late);
-    const auto what = [](const char* event) { return std::string(event) + " can't be used" + OutsideOfTheDay; };
+    const auto told = [](const std::string& file, const std::string& event, const std::string& lengths) {
+        return "cadrel: " + file + ": warning: " + event + " can't be used: the dissolve lasts " + lengths +
+               ", so it is passed over; correct the duration of the dissolve or leave the event out\n";
+    };
 
     const Outcome outcome = film.generate();
 
     EXPECT_EQ(outcome.status, 0);
-    EXPECT_EQ(outcome.err, "cadrel: old.edl: warning: " + what("event 2 in line 2 of old.edl (A009)") +
-                               ", so it is passed over" + CorrectTimecodes +
-                               "cadrel: new.edl: warning: " + what("event 3 in line 2 of new.edl (A008)") +
-                               ", so it is passed over" + CorrectTimecodes);
+    EXPECT_EQ(outcome.err,
+              told("old.edl", "event 2 in line 2 of old.edl (A009)", "9999999 frames, and the event only 252") +
+                  told("new.edl", "event 3 in line 2 of new.edl (A008)", "24 frames, and the event only 11"));
     EXPECT_NE(outcome.out.find("Change EDL  1 event\n"), std::string::npos) << outcome.out;
     EXPECT_EQ(film.generate({"--strict"}).status, 1);
     EXPECT_EQ(runCadrel({"notes", "--old", film.oldFile, "--new", film.newFile}).status, 0);

@@ -2,24 +2,26 @@
 
 #pragma once
 
+#include <memory>
 #include <nlohmann/json.hpp>
 #include <string>
 
 namespace cadrel::tests {
 
-/// Holds JSON against a schema (JSON Schema, draft 2020-12), of which it knows the words that the schemas in docs use. A
-/// word that it doesn't know is an error, so that no rule is passed over.
+/// A JSON schema in docs. The words that these schemas use mean the same in the drafts from 7 on.
 class JsonSchema {
 public:
-    explicit JsonSchema(nlohmann::json schema) : m_schema(std::move(schema)) {}
+    /// The one of `docs/NAME.schema.json`, with those that it refers to. Throws std::runtime_error for a schema that can't
+    /// be one.
+    explicit JsonSchema(const std::string& name);
+    ~JsonSchema();
 
-    /// What is wrong first, and where; empty when nothing is.
-    std::string faultOf(const nlohmann::json& value) const { return faultOf(value, m_schema, "#"); }
+    /// What is wrong with a document, and where; empty when nothing is.
+    std::string faultOf(const nlohmann::json& document) const;
 
 private:
-    std::string faultOf(const nlohmann::json& value, const nlohmann::json& rules, const std::string& where) const;
-
-    nlohmann::json m_schema;
+    struct Rules;
+    std::unique_ptr<Rules> m_rules;
 };
 
 } // namespace cadrel::tests

@@ -55,6 +55,33 @@ TEST(List, ShowsATableWithTheFlawsUnderTheirEventsAndTheTotals)
               "Frame rate  24 fps\n");
 }
 
+TEST(List, ATransitionThatIsLongerThanItsEventIsShown)
+{
+    // Of one second each: as long as its event, a frame longer, and far longer.
+    const TempFolder folder;
+    const std::string file =
+        folder.write("film.edl", "001  A001  V  D  024  10:00:00:00 10:00:01:00 01:00:00:00 01:00:01:00\n"
+                                 "002  A002  V  D  025  10:00:00:00 10:00:01:00 01:00:01:00 01:00:02:00\n"
+                                 "003  A003  V  W001 9999999  10:00:00:00 10:00:01:00 01:00:02:00 01:00:03:00\n");
+
+    const Outcome outcome = runCadrel({"list", file, "--rate", "24"});
+
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(
+        outcome.out,
+        "state   event  roll  clip  file      trans      src in       src out      dst in       dst out      speed\n"
+        "ok      001    A001        film.edl  D 024      10:00:00:00  10:00:01:00  01:00:00:00  01:00:01:00   1.00\n"
+        "length  002    A002        film.edl  D 025      10:00:00:00  10:00:01:00  01:00:01:00  01:00:02:00   1.00\n"
+        "          The dissolve lasts 25 frames, and the event only 24.\n"
+        "length  003    A003        film.edl  W 9999999  10:00:00:00  10:00:01:00  01:00:02:00  01:00:03:00   1.00\n"
+        "          The wipe lasts 9999999 frames, and the event only 24.\n"
+        "\n"
+        "Events      3, all valid, 2 with a transition longer than the event\n"
+        "            0 cuts, 2 dissolves, 1 wipe, 0 retimed\n"
+        "Programme   01:00:00:00 - 01:00:03:00, 00:00:03:00 long\n"
+        "Frame rate  24 fps\n");
+}
+
 TEST(List, SummaryPrintsOnlyTheTotals)
 {
     const TempFolder folder;
@@ -77,13 +104,13 @@ TEST(List, JsonHasExactlyTheKeysOfAnEvent)
     const json events = listAsJson({file}).at("events");
 
     ASSERT_EQ(events.size(), 4U);
-    EXPECT_EQ(events[2], json::parse(R"({"number": 2, "kind": 0, "roll": "A002", "clip": "TWO",
-        "transition": 1, "duration": 12, "srcIn": "11:00:00:00", "srcOut": "11:00:02:00",
+    EXPECT_EQ(events[2], json::parse(R"({"number": 2, "kind": "plain", "roll": "A002", "clip": "TWO",
+        "transition": "dissolve", "duration": 12, "srcIn": "11:00:00:00", "srcOut": "11:00:02:00",
         "dstIn": "01:00:04:00", "dstOut": "01:00:06:00", "speed": 1.0, "vfx": false, "flaws": [],
         "edlFile": "film.edl", "members": []})"));
-    EXPECT_EQ(events[3], json::parse(R"({"number": 3, "kind": 0, "roll": "A003", "clip": "",
-        "transition": 0, "duration": 0, "srcIn": "12:00:00:00", "srcOut": "12:00:04:12",
-        "dstIn": "01:00:06:00", "dstOut": "01:00:08:06", "speed": 2.0, "vfx": false, "flaws": [4],
+    EXPECT_EQ(events[3], json::parse(R"({"number": 3, "kind": "plain", "roll": "A003", "clip": "",
+        "transition": "cut", "duration": 0, "srcIn": "12:00:00:00", "srcOut": "12:00:04:12",
+        "dstIn": "01:00:06:00", "dstOut": "01:00:08:06", "speed": 2.0, "vfx": false, "flaws": ["not-video-event"],
         "edlFile": "film.edl", "members": []})"));
 }
 
@@ -93,7 +120,8 @@ TEST(List, FlawsAscendInTheJson)
     // The roll can't be read (3), nor can SRC OUT (8), which stays uninitialized (0) and so before SRC IN (12).
     const std::string file = folder.write("film.edl", mixedFilm() + "004  A+B  V  C  12:00:00:00 x 1:0:0:0 1:0:0:1\n");
 
-    EXPECT_EQ(listAsJson({file}).at("events").at(4).at("flaws"), json({0, 3, 8, 12}));
+    EXPECT_EQ(listAsJson({file}).at("events").at(4).at("flaws"),
+              json({"timecode-uninitialized", "roll-name-invalid", "src-out-unreadable", "timecode-range-invalid"}));
 }
 
 TEST(List, JsonGoesToAFileBesideTheTable)
@@ -114,7 +142,7 @@ TEST(List, AudioEventsAreFlawedUnlessAccepted)
     const TempFolder folder;
     const std::string file = folder.write("film.edl", mixedFilm());
 
-    EXPECT_EQ(listAsJson({file}).at("events").at(3).at("flaws"), json({4}));
+    EXPECT_EQ(listAsJson({file}).at("events").at(3).at("flaws"), json({"not-video-event"}));
     EXPECT_EQ(listAsJson({file, "--audio"}).at("events").at(3).at("flaws"), json::array());
 }
 
@@ -178,7 +206,7 @@ TEST(List, TheGivenRateDecidesWhatIsValid)
         folder.write("film.edl", cut("001", "A001", "10:01:00:01 10:01:04:01", "01:00:00:00 01:00:04:00"));
 
     EXPECT_EQ(listAsJson({file, "--rate", "29.97 fps"}).at("events").at(0).at("flaws"), json::array());
-    EXPECT_EQ(listAsJson({file, "--rate", "29.97 dfps"}).at("events").at(0).at("flaws"), json({11}));
+    EXPECT_EQ(listAsJson({file, "--rate", "29.97 dfps"}).at("events").at(0).at("flaws"), json({"timecode-invalid"}));
 }
 
 TEST(List, AHigherRateThanTheProjectsIsWarnedOf)

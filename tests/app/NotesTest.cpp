@@ -1,14 +1,15 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/Film.h"
-#include "tests/app/JsonSchema.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/support/TreePaths.h"
 
 #include <algorithm>
 #include <cstddef>
 #include <gtest/gtest.h>
+#include <map>
 #include <nlohmann/json.hpp>
+#include <regex>
 #include <sstream>
 
 namespace {
@@ -23,6 +24,13 @@ std::vector<std::string> linesOf(const std::string& text)
     for (std::string line; std::getline(stream, line);)
         lines.push_back(line);
     return lines;
+}
+
+/// The characters of a text in UTF-8.
+std::ptrdiff_t columnsOf(const std::string& text)
+{
+    return std::count_if(text.begin(), text.end(),
+                         [](char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U; });
 }
 
 /// An old and a new cut in a folder of their own.
@@ -107,7 +115,7 @@ TEST(Notes, NoLineOfTheTextIsWiderThan80Columns)
     const Outcome outcome = runCadrel(reel3({"--feet"}));
 
     for (const std::string& line : linesOf(outcome.out))
-        EXPECT_LE(line.size(), 80U) << line;
+        EXPECT_LE(columnsOf(line), 80) << line;
 }
 
 TEST(Notes, LongNamesMakeNoLineWider)
@@ -169,31 +177,6 @@ TEST(Notes, ACsvTextIsNoFormulaAndKeepsItsQuotes)
     const std::string csv = film.file(".csv");
 
     EXPECT_NE(csv.find(",B002,\"'=1+\"\"A\"\"\","), std::string::npos) << csv;
-}
-
-TEST(Notes, TheJsonKeepsToItsSchema)
-{
-    const JsonSchema schema(json::parse(contentOf(treePath("docs/notes.schema.json"))));
-    const Cuts film(oldCut(), newCut());
-
-    EXPECT_EQ(schema.faultOf(json::parse(film.file(".json", {"--feet"}))), "");
-    EXPECT_EQ(schema.faultOf(reel3Json()), "");
-}
-
-TEST(Notes, TheSchemaRefusesWhatIsNoNotes)
-{
-    const JsonSchema schema(json::parse(contentOf(treePath("docs/notes.schema.json"))));
-    json notes = reel3Json();
-
-    json missing = notes;
-    missing.erase("rate");
-    json surplus = notes;
-    surplus["more"] = 1;
-    json number = notes;
-    number["reels"][0]["rows"][1]["action"] = 0;
-
-    for (const json& wrong : {missing, surplus, number})
-        EXPECT_NE(schema.faultOf(wrong), "");
 }
 
 TEST(Notes, TheFiguresOfTheExampleAreThoseOfItsListOfChanges)
@@ -313,6 +296,93 @@ TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
     EXPECT_NE(outcome.out.find("Old cut, 2 further events: no picture"), std::string::npos) << outcome.out;
 }
 
+/// A text with a single blank wherever there are blanks or line ends.
+std::string unbroken(const std::string& text)
+{
+    std::istringstream stream(text);
+    std::string all;
+    for (std::string word; stream >> word;)
+        all.append(all.empty() ? "" : " ").append(word);
+    return all;
+}
+
+std::string textOfPdf(const std::string& file)
+{
+    const Outcome outcome = runProgram("pdftotext", {"-layout", file, "-"});
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    return outcome.out;
+}
+
+/// The lines of the last block, as the JSON has them.
+std::vector<std::string> remarksIn(const json& notes)
+{
+    const json& healed = notes.at("healed");
+    std::vector<std::string> lines{std::to_string(healed.at("events").get<int>()) +
+                                   " event of the change EDL healed from " +
+                                   std::to_string(healed.at("members").get<int>())};
+    for (const char* const side : {"old", "new"}) {
+        std::map<std::string, int> counts;
+        for (const json& doubt : notes.at(side).at("doubts")) {
+            if (++counts[doubt.at("doubt")] <= 5)
+                lines.push_back(doubt.at("edlFile").get<std::string>() + ", event " +
+                                std::to_string(doubt.at("event").get<int>()) + " (");
+        }
+        int unread = 0;
+        for (const json& line : notes.at(side).at("unread")) {
+            if (++unread <= 5)
+                lines.push_back(line.at("file").get<std::string>() + ", line " +
+                                std::to_string(line.at("line").get<int>()) + " " +
+                                line.at("problem").get<std::string>() + ": \"");
+        }
+        if (unread > 5)
+            lines.push_back(std::string(side == std::string("old") ? "Old" : "New") + " cut, " +
+                            std::to_string(unread - 5) + " further line");
+    }
+    return lines;
+}
+
+TEST(Notes, WhatIsHealedDoubtedAndNotReadStandsInEveryForm)
+{
+    std::string broken;
+    for (int line = 0; line < 7; ++line)
+        broken += "02" + std::to_string(line) + "  A004  V  C  12:00:00:00 12:00:01:00 01:00:30:00\n";
+    const std::string reversed = cut("009", "A009", "10:00:05:00 10:00:04:00", "01:00:40:00 01:00:41:00");
+    const std::string sound = "010  S001  A  C  10:00:00:00 10:00:01:00 01:00:00:00 01:00:01:00\n";
+    const Cuts film(oldCut() + broken + cut("008", "AX", "10:00:00:00 10:00:01:00", "01:00:30:00 01:00:31:00"),
+                    newCut() + "021  A004  V  C  12:00:00:00 12:00:01:00 01:00:30:00\n" +
+                        cut("008", "AX", "10:00:00:00 10:00:01:00", "01:00:32:00 01:00:33:00") + reversed + sound);
+
+    const json notes = json::parse(film.file(".json"));
+    const std::string pdf = film.folder / "notes.pdf";
+    film.file(".pdf");
+    const std::string text = film.notes().out;
+    std::string html = film.file(".html");
+    for (std::size_t at = 0; (at = html.find("&quot;", at)) != std::string::npos;)
+        html.replace(at, 6, 1, '"');
+
+    ASSERT_EQ(notes.at("old").at("unread").size(), 7U);
+    // The head of the old cut has two lines, and each of its three shots has two.
+    EXPECT_EQ(notes.at("old").at("unread")[0],
+              (json{{"file", "old.edl"},
+                    {"line", 8},
+                    {"problem", "misses a field and isn't read"},
+                    {"text", "020  A004  V  C  12:00:00:00 12:00:01:00 01:00:30:00"}}));
+    ASSERT_EQ(notes.at("new").at("unread").size(), 1U);
+    EXPECT_EQ(notes.at("old").at("doubts").size(), 1U);
+    EXPECT_EQ(notes.at("new").at("doubts").size(), 3U);
+    // THREE and the shot after it.
+    EXPECT_EQ(notes.at("healed"), (json{{"events", 1}, {"members", 2}, {"bridgedGaps", 0}}));
+    const std::vector<std::string> remarks = remarksIn(notes);
+    // Healing, a doubt and six lines of the old cut, three doubts and a line of the new one.
+    EXPECT_EQ(remarks.size(), 12U);
+    for (const std::string& form : {text, html, textOfPdf(pdf)}) {
+        for (const std::string& remark : remarks)
+            EXPECT_NE(unbroken(form).find(remark), std::string::npos) << remark << "\n" << form;
+    }
+    for (const std::string& line : linesOf(text))
+        EXPECT_LE(columnsOf(line), 80) << line;
+}
+
 TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
 {
     // 20 s of new picture come first, so that the last shot is at 00:00:10:00 when it is to be moved.
@@ -327,6 +397,21 @@ TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
 
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_NE(outcome.out.find("move 00:00:05:00 from 00:00:10:00"), std::string::npos) << outcome.out;
+}
+
+TEST(Notes, PictureThatGoesToALaterReelIsToldWhereItGoes)
+{
+    const std::string one = cut("001", "A001", "10:00:00:12 10:00:20:12", "01:00:00:00 01:00:20:00");
+    const Cuts film(one + cut("002", "A002", "10:00:00:00 10:00:10:00", "01:00:20:00 01:00:30:00") +
+                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:00:00 02:00:30:00"),
+                    one + cut("002", "A002", "10:00:00:00 10:00:10:00", "02:00:00:00 02:00:10:00") +
+                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:10:00 02:00:40:00"));
+
+    const Outcome outcome = film.notes();
+
+    EXPECT_NE(outcome.out.find("   1  01:00:20:00  move 00:00:10:00 to 02:00:00:00     -00:00:10:00 -00:00:10:00\n"),
+              std::string::npos)
+        << outcome.out;
 }
 
 TEST(Notes, ACutHasNothingToTellOfItself)
@@ -348,6 +433,47 @@ TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_NE(outcome.out.find("   1  01:00:00:00  replace 00:00:30:00 by 00:00:10:00"), std::string::npos)
         << outcome.out;
+}
+
+TEST(Notes, DropFrameShowsInASemicolonForPeopleAlone)
+{
+    const Cuts film(oldCut(), newCut());
+    const std::regex withColons(R"(\d\d:\d\d:\d\d:\d\d)");
+    const std::regex withSemicolon(R"(\d\d:\d\d:\d\d;\d\d)");
+    const std::vector<std::string> dropFrame{"--rate", "29.97 dfps"};
+
+    const std::string text = film.notes(dropFrame).out;
+
+    EXPECT_NE(text.find("01:00:10;00"), std::string::npos) << text;
+    EXPECT_FALSE(std::regex_search(text, withColons)) << text;
+    EXPECT_TRUE(std::regex_search(film.file(".html", dropFrame), withSemicolon));
+    // The columns of the table are for programs, the words in it for people.
+    EXPECT_TRUE(std::regex_search(film.file(".csv", dropFrame), withColons));
+    const std::string document = film.file(".json", dropFrame);
+    EXPECT_TRUE(std::regex_search(document, withColons));
+    EXPECT_FALSE(std::regex_search(document, withSemicolon));
+    EXPECT_FALSE(std::regex_search(film.notes({"--rate", "30 fps"}).out, withSemicolon));
+}
+
+TEST(Notes, AFileThatComesUpDuringTheRunIsNotOverwritten)
+{
+    const std::string shots = manyShots(20000);
+    const TempFolder folder;
+    const std::string notes = folder / "notes.txt";
+    const std::vector<std::string> words{
+        "notes", "--old", folder.write("old.edl", shots), "--new", folder.write("new.edl", shots), "-o", notes};
+    const auto disturb = [&] { writeFile(notes, "of another program"); };
+
+    const Outcome outcome = runCadrelDisturbedAt("reading new.edl", words, disturb);
+
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_NE(outcome.out.find(notes + ": another program has written it meanwhile"), std::string::npos) << outcome.out;
+    EXPECT_EQ(contentOf(notes), "of another program");
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"new.edl", "notes.txt", "old.edl"}));
+    std::vector<std::string> replacing = words;
+    replacing.emplace_back("--overwrite");
+    EXPECT_EQ(runCadrelDisturbedAt("reading new.edl", replacing, disturb).status, 0);
+    EXPECT_NE(contentOf(notes), "of another program");
 }
 
 TEST(Notes, RefusesAFormThatItDoesNotKnow)

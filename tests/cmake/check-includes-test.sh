@@ -1,4 +1,5 @@
 #!/bin/sh
+# SPDX-License-Identifier: GPL-3.0-or-later
 # check-includes-test.sh SCRIPT: makes small trees in a folder of its own and looks at what SCRIPT refuses in them.
 # The backquotes are those of the table.
 # shellcheck disable=SC2016

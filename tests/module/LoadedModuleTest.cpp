@@ -1,114 +1,42 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/Application.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/edit/ProjectManager.h"
-#include "standin/module/ModuleLoader.h"
 #include "standin/project/Project.h"
+#include "standin/services/IdleManager.h"
 #include "standin/services/WindowFactoryRegistry.h"
-#include "standin/window/HostWindow.h"
-#include "standin/window/ViewManager.h"
-#include "velmark/FieldText.h"
 #include "velmark/UserInterface.h"
 
+#include "tests/module/LoadedModule.h"
+#include "tests/support/ThisProcess.h"
 #include "tests/support/TreePaths.h"
-#include "tests/support/x11/VirtualScreen.h"
-#include "tests/support/x11/XWindows.h"
+#include "tests/support/host/AlteredContext.h"
 
 #include <gtest/gtest.h>
 
-#include <chrono>
 #include <cstdio>
-#include <filesystem>
-#include <fstream>
-#include <functional>
 #include <set>
 #include <string>
-#include <thread>
-#include <vector>
 
 #include <X11/Xlib.h>
 
-#include <dlfcn.h>
 #include <unistd.h>
 
 using namespace Velmark;
-using cadrel::tests::VirtualScreen;
-using cadrel::tests::XWindows;
-using standin::Application;
-using standin::ModuleLoader;
-
-namespace fs = std::filesystem;
+using cadrel::tests::isModuleMapped;
+using cadrel::tests::ModuleFunctions;
+using cadrel::tests::modulePath;
+using cadrel::tests::ProcessResources;
 
 namespace {
 
-constexpr unsigned long Background = 0x2b2c2d;
+using LoadedModuleTest = cadrel::tests::LoadedModule;
 
-fs::path modulePath()
-{
-    return fs::path(cadrel::tests::programPath("../lib/Cadrel.so")).lexically_normal();
-}
+class OtherHost : public Implements<OtherHost, FObject, IHostInfo> {
+public:
+    static constexpr const char* ClassName = "OtherHost";
 
-fs::path resources()
-{
-    return cadrel::tests::treePath("resources");
-}
-
-bool isMapped()
-{
-    std::ifstream maps("/proc/self/maps");
-    for (std::string line; std::getline(maps, line);) {
-        if (line.ends_with("/Cadrel.so"))
-            return true;
-    }
-    return false;
-}
-
-std::size_t countOf(const fs::path& folder)
-{
-    return static_cast<std::size_t>(std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
-}
-
-/// A host with a screen, which may load the module.
-class LoadedModuleTest : public testing::Test {
-protected:
-    LoadedModuleTest() { m_application.views().setWindowSystem(&m_windows); }
-    ~LoadedModuleTest() override { m_application.views().setWindowSystem(nullptr); }
-
-    void load() { m_module = std::make_unique<ModuleLoader>(m_application, modulePath(), resources()); }
-    void unload() { m_module.reset(); }
-
-    /// Lets host and module work for one turn of the host's loop.
-    void turn()
-    {
-        m_windows.serve();
-        m_application.idle();
-        std::this_thread::sleep_for(std::chrono::milliseconds(15));
-    }
-    /// Until the condition holds; false when it doesn't within ten seconds.
-    bool turnUntil(const std::function<bool()>& condition)
-    {
-        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-        while (!condition()) {
-            if (std::chrono::steady_clock::now() > end)
-                return false;
-            turn();
-        }
-        return true;
-    }
-
-    bool openWindow() { return m_application.choose(m_application.menus().commands().front()) && window(); }
-    standin::HostWindow* window()
-    {
-        const auto& open = m_application.views().windows();
-        return open.empty() ? nullptr : open.front().get();
-    }
-    bool isDrawn() { return m_windows.colourAt(400, 400) == Background; }
-
-    VirtualScreen m_screen;
-    XWindows m_windows;
-    Application m_application;
-    std::unique_ptr<ModuleLoader> m_module;
+    const char* getName() override { return "Studio"; }
 };
 
 } // namespace
@@ -158,22 +86,73 @@ TEST_F(LoadedModuleTest, NamesItsMakerAndItsOneClass)
 
 TEST_F(LoadedModuleTest, GivesTheSameFactoryUntilItsLastRelease)
 {
-    void* const object = dlopen(modulePath().c_str(), RTLD_NOW | RTLD_LOCAL);
-    ASSERT_NE(object, nullptr);
-    auto* const getFactory = reinterpret_cast<IPluginFactory* (*)()>(dlsym(object, "GetPluginFactory"));
+    const ModuleFunctions module;
 
-    IPluginFactory* const first = getFactory();
-    IPluginFactory* const second = getFactory();
+    IPluginFactory* const first = module.getFactory();
+    IPluginFactory* const second = module.getFactory();
     EXPECT_EQ(first, second);
     EXPECT_EQ(first->countClasses(), 1);
     EXPECT_EQ(first->release(), 1);
     EXPECT_EQ(first->release(), 0);
 
-    IPluginFactory* const third = getFactory();
+    IPluginFactory* const third = module.getFactory();
     ASSERT_NE(third, nullptr);
     EXPECT_EQ(third->countClasses(), 1);
     EXPECT_EQ(third->release(), 0);
-    dlclose(object);
+}
+
+TEST_F(LoadedModuleTest, TakesItsResourcesFromTheFirstEntrySinceItWasOutOfUse)
+{
+    const ModuleFunctions module;
+    std::string resources = cadrel::tests::treePath("resources");
+    std::string elsewhere = "/nowhere";
+    EXPECT_TRUE(module.enter(nullptr));
+    EXPECT_TRUE(module.enter(resources.data()));
+    EXPECT_TRUE(module.enter(elsewhere.data()));
+    EXPECT_TRUE(module.leave());
+    auto controller = module.makeController();
+    const auto canOpen = [&] {
+        EXPECT_EQ(controller->initialize(m_application.context()), ResultOk);
+        const bool isOpen = openWindow();
+        controller->terminate();
+        return isOpen;
+    };
+    EXPECT_TRUE(canOpen());
+
+    EXPECT_TRUE(module.leave());
+    EXPECT_TRUE(module.leave()) << "One too many.";
+    EXPECT_TRUE(module.enter(elsewhere.data()));
+    EXPECT_FALSE(canOpen());
+
+    EXPECT_TRUE(module.leave());
+    EXPECT_TRUE(module.enter(resources.data()));
+    EXPECT_TRUE(canOpen());
+    EXPECT_TRUE(module.leave());
+    controller.reset();
+}
+
+TEST_F(LoadedModuleTest, MakesNothingOfAnotherClass)
+{
+    load();
+    void* out = this;
+
+    EXPECT_NE(m_module->factory().createInstance(IPluginBase::iid, IPluginBase::iid, &out), ResultOk);
+    EXPECT_EQ(out, nullptr);
+    EXPECT_NE(m_module->factory().createInstance(Identifier("F61C1C254C9D4D68A782F7FBF56B9068"), IHostInfo::iid, &out),
+              ResultOk);
+    EXPECT_EQ(out, nullptr);
+}
+
+TEST_F(LoadedModuleTest, WorksInNoHostOfAnotherName)
+{
+    const auto context = makeCounted<cadrel::host::tests::AlteredContext>(m_application.context());
+    context->replace(IHostInfo::iid, makeCounted<OtherHost>());
+
+    EXPECT_THROW(load(context.get()), standin::ModuleError);
+    EXPECT_TRUE(m_application.menus().commands().empty());
+    EXPECT_TRUE(m_application.windowFactories().factories().empty());
+    EXPECT_TRUE(m_application.idleManager().handlers().empty());
+    EXPECT_FALSE(isModuleMapped());
 }
 
 TEST_F(LoadedModuleTest, EntersItsCommandAndItsWindowAndTakesThemBack)
@@ -239,19 +218,17 @@ TEST_F(LoadedModuleTest, IsUnmappedAfterEachOfTwentyRounds)
     ASSERT_TRUE(openWindow());
     ASSERT_TRUE(turnUntil([this] { return isDrawn(); }));
     unload();
-    ASSERT_FALSE(isMapped());
-    const std::size_t threads = countOf("/proc/self/task");
-    const std::size_t descriptors = countOf("/proc/self/fd");
+    ASSERT_FALSE(isModuleMapped());
+    const ProcessResources before;
 
     for (int round = 0; round < 20; ++round) {
         load();
-        ASSERT_TRUE(isMapped()) << round;
+        ASSERT_TRUE(isModuleMapped()) << round;
         ASSERT_TRUE(openWindow()) << round;
         ASSERT_TRUE(turnUntil([this] { return isDrawn(); })) << round;
         unload();
-        ASSERT_FALSE(isMapped()) << round;
-        EXPECT_EQ(countOf("/proc/self/task"), threads) << round;
-        EXPECT_EQ(countOf("/proc/self/fd"), descriptors) << round;
+        ASSERT_FALSE(isModuleMapped()) << round;
+        EXPECT_EQ(ProcessResources(), before) << round;
     }
 }
 
@@ -282,8 +259,7 @@ TEST_F(LoadedModuleTest, SurvivesAWindowOfTheHostThatGoesFirst)
     ASSERT_TRUE(turnUntil([this] { return isDrawn(); }));
 
     m_windows.destroy(*window()->native());
-    for (int count = 0; count < 10; ++count)
-        turn();
+    turn(10);
     window()->show(false);
 
     ASSERT_TRUE(openWindow());
@@ -297,7 +273,7 @@ TEST_F(LoadedModuleTest, StaysInMemoryWhereSomebodyMayStillCallItsErrorHandler)
         load();
         XSetErrorHandler([](Display*, XErrorEvent*) { return 0; });
         unload();
-        return isMapped();
+        return isModuleMapped();
     };
     EXPECT_EXIT(_exit(isStillMapped() ? 0 : 1), testing::ExitedWithCode(0), "");
 }
@@ -316,7 +292,7 @@ TEST_F(LoadedModuleTest, LetsGoOfAViewThatTheHostKeeps)
     view.reset();
     unload();
 
-    EXPECT_FALSE(isMapped());
+    EXPECT_FALSE(isModuleMapped());
 }
 
 TEST_F(LoadedModuleTest, MakesItsViewForItsOwnWindowAndOnlyOnce)
@@ -382,7 +358,7 @@ TEST_F(LoadedModuleTest, SurvivesItsUnloadingWithTheWindowOpenAndUndoAfterwards)
     unload();
 
     EXPECT_EQ(window(), nullptr);
-    EXPECT_FALSE(isMapped());
+    EXPECT_FALSE(isModuleMapped());
     m_application.actions().invoke(IActionManager::EditCategory, IActionManager::Undo, 0);
     turn();
 }

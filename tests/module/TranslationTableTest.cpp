@@ -18,11 +18,15 @@ namespace fs = std::filesystem;
 
 namespace {
 
-/// What is the same in every language: the beginnings of the names of markers, which the project keeps; and what marks a
-/// mistake of the program.
+/// What is the same in every language: the beginnings of the names of markers, which the project keeps; what marks a mistake of
+/// the program; what a value takes the place of; and the ends of file names.
 const std::set<std::string> NotTranslated = {
-    "Overlap in ", "Audio snippet in ", "Automation warning in ", "Event: ", "INVALID!",
+    "%s", "edl", "Overlap in ", "Audio snippet in ", "Automation warning in ", "Event: ", "INVALID!",
 };
+
+/// What a German sound editor calls so too.
+const std::set<std::string> SameInGerman = {"Cadrel", "OK",      "EDLs",   "IN",      "OUT",
+                                            "SRC IN", "SRC OUT", "DST IN", "DST OUT", "Normal"};
 
 /// The wide texts of the sources that hold a letter: all that the user reads in the host goes out in this form.
 std::set<std::string> textsOfTheSources()
@@ -69,7 +73,6 @@ TEST(TranslationTable, IsReadByTheHost)
     translations->setLanguage("de");
     for (const std::string& text : textsOfTheTable()) {
         const std::u16string source = standin::toUtf16(text);
-        // All but the product's own name are other words in German.
-        EXPECT_EQ(source == translations->translate(source.c_str()), text == "Cadrel") << text;
+        EXPECT_EQ(source == translations->translate(source.c_str()), SameInGerman.contains(text)) << text;
     }
 }

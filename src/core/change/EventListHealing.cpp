@@ -51,8 +51,12 @@ EventList takeUntimed(EventList& events)
 }
 
 /// Whether two neighbours in the selection have other events between them in the whole list.
-bool isFragmented(const CutMap& selected, const CutMap& whole)
+bool isFragmented(const CutMap& selected, const EventList& list)
 {
+    // It has no neighbours then, and the list may be long.
+    if (selected.dstInOrder().size() < 2)
+        return false;
+    const CutMap whole(list, Timecode::framerate());
     using Neighbours = std::pair<std::shared_ptr<EventBase>, std::shared_ptr<EventBase>>;
     const auto neighboursOf = [](const CutMap& map) {
         std::set<Neighbours> neighbours;
@@ -133,7 +137,7 @@ void EventList::healSelection(const EventList& selection, const EventList& refer
 bool EventList::canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const
 {
     const CutMap selected(selection, Timecode::framerate());
-    if (isFragmented(selected, CutMap(*this, Timecode::framerate())))
+    if (isFragmented(selected, *this))
         return false;
     EventList collected = withoutHealing(*this, selected);
     const EventList untimed = takeUntimed(collected);

@@ -6,12 +6,14 @@
 #include "core/edl/EventList.h"
 #include "util/FilePath.h"
 #include "util/FileReplacement.h"
+#include "util/FileStamp.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
 #include <deque>
 #include <iomanip>
 #include <memory>
+#include <optional>
 #include <span>
 #include <sstream>
 
@@ -69,15 +71,18 @@ void writeFile(const std::wstring& path, Events events, Mode mode, FileReplaceme
     file.finish();
 }
 
-void writeOne(const std::wstring& path, Events events, Mode mode)
+/// The state in which targets have to be; nothing for any.
+using Expected = std::optional<util::FileStamp>;
+
+void writeOne(const std::wstring& path, Events events, Mode mode, const Expected& expected)
 {
     FileReplacement file(util::toFilePath(path));
     writeFile(path, events, mode, file);
-    file.commit();
+    file.commit(expected);
 }
 
 /// All files are written before the first one is put in place. If that fails for one of them, all are taken back.
-void writeSeveral(const std::wstring& path, Events events, Mode mode)
+void writeSeveral(const std::wstring& path, Events events, Mode mode, const Expected& expected)
 {
     std::deque<FileReplacement> files;
     while (!events.empty()) {
@@ -87,7 +92,7 @@ void writeSeveral(const std::wstring& path, Events events, Mode mode)
         events = events.subspan(part.size());
     }
     for (FileReplacement& file : files)
-        file.putInPlace();
+        file.putInPlace(expected);
     for (FileReplacement& file : files)
         file.keep();
 }
@@ -137,11 +142,14 @@ Result::Type CmxWriter::write(const std::wstring& path, const EventList& events)
 try {
     if (events.isEmpty() || !events.hasReadableEvent())
         return Result::InvalidArgument;
+    const Expected expected = m_existing == Existing::Kept ? Expected(util::FileStamp()) : std::nullopt;
     if (events.size() <= MostEventsInAFile)
-        writeOne(path, events.events(), m_mode);
+        writeOne(path, events.events(), m_mode, expected);
     else
-        writeSeveral(path, events.events(), m_mode);
+        writeSeveral(path, events.events(), m_mode, expected);
     return Result::Ok;
+} catch (const FileReplacement::TargetChanged&) {
+    return Result::Refused;
 } catch (Result::Type failure) {
     return failure;
 }

@@ -27,11 +27,17 @@ public:
     /// non-drop, since all are written with ":".
     enum class FrameCountMode { Unsaid, DropFrame };
 
-    explicit CmxWriter(FrameCountMode mode = FrameCountMode::Unsaid) : m_mode(mode) {}
+    /// Whether a file that stands under the name by the time that the list is complete is replaced.
+    enum class Existing { Replaced, Kept };
+
+    explicit CmxWriter(FrameCountMode mode = FrameCountMode::Unsaid, Existing existing = Existing::Replaced)
+        : m_mode(mode), m_existing(existing)
+    {
+    }
 
     /// Returns InvalidArgument for an empty list and for one without a readable event, FileAccessFailed when the file
-    /// can't be opened or written, NotAvailable when it could be but has an empty last component, or what is thrown
-    /// while writing.
+    /// can't be opened or written, NotAvailable when it could be but has an empty last component, Refused where a file is to
+    /// be kept, or what is thrown while writing.
     util::Result::Type write(const std::wstring& path, const EventList& events) override;
 
     /// A roll name as the file's eight columns take it: capitals, digits and ".-_", and "SHOT_-12" for
@@ -40,6 +46,7 @@ public:
 
 private:
     FrameCountMode m_mode;
+    Existing m_existing;
 };
 
 } // namespace cadrel::core::fileio

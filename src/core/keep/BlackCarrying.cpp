@@ -7,6 +7,7 @@
 #include <iterator>
 #include <limits>
 #include <map>
+#include <optional>
 #include <set>
 
 namespace cadrel::core {
@@ -16,36 +17,6 @@ namespace {
 /// Before and after everything, far enough from the end of the numbers that a shift doesn't reach it.
 constexpr FrameRange AllTime{std::numeric_limits<std::int32_t>::min() / 2,
                              std::numeric_limits<std::int32_t>::max() / 2};
-
-std::int32_t lengthOf(const FrameRanges& ranges)
-{
-    std::int32_t length = 0;
-    for (const FrameRange& range : ranges)
-        length += range.length();
-    return length;
-}
-
-/// The shifts of those frames of an island of old picture that survive nearest to its start and to its end.
-struct IslandEdges {
-    std::int32_t first = std::numeric_limits<std::int32_t>::max();
-    std::int32_t last = std::numeric_limits<std::int32_t>::min();
-    std::vector<std::int32_t> shiftsAtFirst;
-    std::vector<std::int32_t> shiftsAtLast;
-
-    void add(const FrameRange& source, std::int32_t shift)
-    {
-        if (source.start < first)
-            shiftsAtFirst.clear();
-        if (source.start <= first)
-            shiftsAtFirst.push_back(shift);
-        first = std::min(first, source.start);
-        if (source.end > last)
-            shiftsAtLast.clear();
-        if (source.end >= last)
-            shiftsAtLast.push_back(shift);
-        last = std::max(last, source.end);
-    }
-};
 
 /// Ranges out of which others are taken, in no more time than what they meet takes.
 class Leftover {
@@ -89,6 +60,64 @@ private:
 
 } // namespace
 
+/// The shifts of those frames of an island of old picture that survive nearest to its start and to its end.
+struct BlackCarrying::IslandEdges {
+    std::int32_t first = std::numeric_limits<std::int32_t>::max();
+    std::int32_t last = std::numeric_limits<std::int32_t>::min();
+    std::vector<std::int32_t> shiftsAtFirst;
+    std::vector<std::int32_t> shiftsAtLast;
+
+    bool isEmpty() const { return shiftsAtFirst.empty(); }
+
+    void add(const FrameRange& source, std::int32_t shift)
+    {
+        if (source.start < first)
+            shiftsAtFirst.clear();
+        if (source.start <= first)
+            shiftsAtFirst.push_back(shift);
+        first = std::min(first, source.start);
+        if (source.end > last)
+            shiftsAtLast.clear();
+        if (source.end >= last)
+            shiftsAtLast.push_back(shift);
+        last = std::max(last, source.end);
+    }
+};
+
+/// Black between two islands of a reel.
+struct BlackCarrying::Gap {
+    FrameRange frames;
+    const IslandEdges* left;
+    const IslandEdges* right;
+    const IslandEdges* nearestLeft; ///< of the reel's islands on that side of which something survives; null for none
+    const IslandEdges* nearestRight;
+
+    /// Whether a place in the new programme has next to it, on one side, the picture that survives nearest to the gap.
+    /// Where none survives, any place will do.
+    bool isBesideItsPicture(const FrameRange& place, const FrameRanges& picture) const
+    {
+        if (nearestLeft == nullptr && nearestRight == nullptr)
+            return true;
+        const auto isAfter = [&](std::int32_t shift) {
+            return isClear({nearestLeft->last + shift, place.start}, picture);
+        };
+        const auto isBefore = [&](std::int32_t shift) {
+            return isClear({place.end, nearestRight->first + shift}, picture);
+        };
+        return (nearestLeft != nullptr && std::ranges::any_of(nearestLeft->shiftsAtLast, isAfter)) ||
+               (nearestRight != nullptr && std::ranges::any_of(nearestRight->shiftsAtFirst, isBefore));
+    }
+
+private:
+    /// Whether the way runs forwards and meets no picture.
+    static bool isClear(const FrameRange& way, const FrameRanges& picture)
+    {
+        const auto next = std::partition_point(picture.begin(), picture.end(),
+                                               [&way](const FrameRange& range) { return range.end <= way.start; });
+        return way.start <= way.end && (next == picture.end() || next->start >= way.end);
+    }
+};
+
 BlackCarrying::BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLit, const Reels& reels,
                              const FrameRanges& material, const Framerate& framerate, CarriedStretches& carried)
     : m_oldLit(oldLit), m_newLit(newLit), m_reels(reels),
@@ -122,19 +151,37 @@ void BlackCarrying::carryWithinReels()
                                                  [&](const FrameRange& lit) { return lit.end <= source.start; });
         islands[static_cast<std::size_t>(island - m_oldLit.begin())].add(source, stretch.shift);
     }
+    std::vector<Gap> gaps;
+    const IslandEdges* nearest = nullptr;
     for (std::size_t index = 0; index + 1 < m_oldLit.size(); ++index) {
-        const FrameRange gap{m_oldLit[index].end, m_oldLit[index + 1].start};
-        if (gap.length() < m_partingGap)
-            carryBetween(gap, islands[index].shiftsAtLast, islands[index + 1].shiftsAtFirst,
-                         islands[index].last == gap.start);
+        Gap gap{
+            {m_oldLit[index].end, m_oldLit[index + 1].start}, &islands[index], &islands[index + 1], nullptr, nullptr};
+        nearest = gap.left->isEmpty() ? nearest : gap.left;
+        if (gap.frames.length() >= m_partingGap) {
+            nearest = nullptr;
+            continue;
+        }
+        gap.nearestLeft = nearest;
+        gaps.push_back(gap);
     }
+    for (auto gap = gaps.rbegin(); gap != gaps.rend(); ++gap) {
+        const bool isLastOfReel = gap == gaps.rbegin() || std::prev(gap)->left != gap->right;
+        nearest = isLastOfReel ? nullptr : nearest;
+        nearest = gap->right->isEmpty() ? nearest : gap->right;
+        gap->nearestRight = nearest;
+    }
+    const FrameRanges picture = m_carried.destinations();
+    for (const Gap& gap : gaps)
+        carryBetween(gap, picture);
 }
 
 // The black between two shots goes where both have gone, if they have stayed together; else where more of it finds
-// room; where either has as much, after the left one unless its end is gone.
-void BlackCarrying::carryBetween(const FrameRange& gap, const std::vector<std::int32_t>& leftShifts,
-                                 const std::vector<std::int32_t>& rightShifts, bool isLeftWhole)
+// room; where either has as much, after the left one unless its end is gone. It always goes next to one of the two.
+void BlackCarrying::carryBetween(const Gap& gap, const FrameRanges& picture)
 {
+    const std::vector<std::int32_t>& leftShifts = gap.left->shiftsAtLast;
+    const std::vector<std::int32_t>& rightShifts = gap.right->shiftsAtFirst;
+    const bool isLeftWhole = gap.left->last == gap.frames.start;
     const std::set<std::int32_t> right(rightShifts.begin(), rightShifts.end());
     std::vector<std::int32_t> candidates;
     std::copy_if(leftShifts.begin(), leftShifts.end(), std::back_inserter(candidates),
@@ -145,16 +192,18 @@ void BlackCarrying::carryBetween(const FrameRange& gap, const std::vector<std::i
     candidates.insert(candidates.end(), others.begin(), others.end());
     candidates.push_back(0);
 
-    std::int32_t best = 0;
+    std::optional<std::int32_t> best;
     std::int32_t mostRoom = 0;
     for (const std::int32_t shift : candidates) {
-        const std::int32_t room = lengthOf(roomIn(gap.shiftedBy(shift)));
-        if (room > mostRoom) {
+        const FrameRange place = gap.frames.shiftedBy(shift);
+        const std::int32_t room = lengthOf(roomIn(place));
+        if (room > mostRoom && gap.isBesideItsPicture(place, picture)) {
             mostRoom = room;
             best = shift;
         }
     }
-    carry(gap, best, AllTime);
+    if (best)
+        carry(gap.frames, *best, AllTime);
 }
 
 void BlackCarrying::carryAroundReels()

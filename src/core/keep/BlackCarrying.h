@@ -4,8 +4,8 @@
 
 #include "core/keep/CarriedStretches.h"
 #include "core/keep/ChangeStretch.h"
-#include "core/keep/FrameRange.h"
-#include "core/keep/Reels.h"
+#include "core/picture/FrameRange.h"
+#include "core/picture/Reels.h"
 #include "core/time/Framerate.h"
 
 #include <cstdint>
@@ -16,7 +16,8 @@ namespace cadrel::core {
 /// Carries over what stands in the black of the old cut, after its picture. Each frame of black goes to one place at
 /// most, and never under a picture of the new cut.
 ///
-/// Black within a reel goes along with the picture beside it. Around the reels it depends on what stands there: blocks
+/// Black within a reel goes along with the picture beside it. What stands in the black of a scene that is gone has no place
+/// any more. Around the reels it depends on what stands there: blocks
 /// are material less than 60 seconds apart.
 ///
 ///     reel |--| tail                              2-pop |--| reel
@@ -40,6 +41,8 @@ public:
     const FrameRanges& outsideOfDay() const { return m_outsideOfDay; }
 
 private:
+    struct IslandEdges;
+    struct Gap;
     /// Black between two reels, or beside the first or the last.
     struct Surroundings {
         FrameRange oldFrames;
@@ -49,8 +52,8 @@ private:
     };
 
     void carryWithinReels();
-    void carryBetween(const FrameRange& gap, const std::vector<std::int32_t>& leftShifts,
-                      const std::vector<std::int32_t>& rightShifts, bool isLeftWhole);
+    /// `picture` is what has been carried over.
+    void carryBetween(const Gap& gap, const FrameRanges& picture);
     void carryAroundReels();
     void carryAsChanged(const std::vector<ChangeStretch>& changes);
     std::vector<Surroundings> surroundings() const;

@@ -2,7 +2,7 @@
 
 #include "core/keep/CarriedStretches.h"
 
-#include "core/keep/PictureComparison.h"
+#include "core/picture/PictureComparison.h"
 
 #include <iterator>
 

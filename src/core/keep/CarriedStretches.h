@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 
 #include <cstdint>
 #include <map>

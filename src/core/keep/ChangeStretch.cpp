@@ -7,6 +7,8 @@
 #include "core/edl/HealedEvent.h"
 
 #include <algorithm>
+#include <map>
+#include <utility>
 
 namespace cadrel::core {
 
@@ -42,6 +44,19 @@ std::vector<ChangeStretch> unhealedStretches(const EventList& changeEvents, cons
         return a.destination.start < b.destination.start;
     });
     return stretches;
+}
+
+std::vector<ChangeStretch> joinedByShift(const std::vector<ChangeStretch>& stretches)
+{
+    std::map<std::int32_t, FrameRanges> byShift;
+    for (const ChangeStretch& stretch : stretches)
+        byShift[stretch.shift].push_back(stretch.destination);
+    std::vector<ChangeStretch> joined;
+    for (auto& [shift, destinations] : byShift) {
+        for (const FrameRange& destination : united(std::move(destinations)))
+            joined.push_back({destination, shift});
+    }
+    return joined;
 }
 
 } // namespace cadrel::core

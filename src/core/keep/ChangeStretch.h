@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 #include "core/time/Framerate.h"
 
 #include <optional>
@@ -27,5 +27,8 @@ std::optional<ChangeStretch> changeStretchOf(const EventBase& event, const Frame
 
 /// What a change EDL carries, without healing, ascending by destination.
 std::vector<ChangeStretch> unhealedStretches(const EventList& changeEvents, const Framerate& framerate);
+
+/// The stretches with those joined that touch and have one shift.
+std::vector<ChangeStretch> joinedByShift(const std::vector<ChangeStretch>& stretches);
 
 } // namespace cadrel::core

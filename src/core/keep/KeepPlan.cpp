@@ -11,12 +11,4 @@ bool KeptEvent::holds(CarriedFrom from) const
     return std::any_of(parts.begin(), parts.end(), [from](const CarriedStretch& part) { return part.from == from; });
 }
 
-std::int32_t KeepRefusal::amount() const
-{
-    std::int32_t frames = 0;
-    for (const FrameRange& range : material)
-        frames += range.length();
-    return frames;
-}
-
 } // namespace cadrel::core

@@ -3,7 +3,7 @@
 #pragma once
 
 #include "core/keep/CarriedStretches.h"
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 #include "core/time/SecondsRange.h"
 
 #include <cstdint>
@@ -22,7 +22,7 @@ struct KeptEvent {
     bool holds(CarriedFrom from) const;
 };
 
-/// Why a plan can't be carried out as it is.
+/// What keeps a plan from being carried out without further ado.
 struct KeepRefusal {
     enum Reason {
         UnequalReels,    ///< the reels of the two cuts can't be paired; see `oldReels` and `newReels`
@@ -36,12 +36,15 @@ struct KeepRefusal {
     FrameRanges material; ///< in frames of the old programme; may reach out of the day
 
     /// How much of `material` there is, in frames.
-    std::int32_t amount() const;
+    std::int32_t amount() const { return lengthOf(material); }
 };
 
 /// What a run has to do.
 struct KeepPlan {
-    /// Set when nothing must be written before the user has decided. The rest tells what would be done all the same.
+    /// What the user has to decide before anything is written. The rest tells what is done if he goes on all the same: what
+    /// stands around reels that can't be paired stays where it is, and material in the way goes.
+    std::vector<KeepRefusal> questions;
+    /// Why nothing can be written at all.
     std::optional<KeepRefusal> refusal;
     /// The list to carry out, ascending by destination. It can be empty although there is a hull: what stands there
     /// goes then.

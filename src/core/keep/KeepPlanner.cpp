@@ -8,9 +8,9 @@
 #include "core/keep/ChangeStretch.h"
 #include "core/keep/Material.h"
 #include "core/keep/PictureCarrying.h"
-#include "core/keep/PictureLine.h"
-#include "core/keep/PictureNames.h"
-#include "core/keep/Reels.h"
+#include "core/picture/PictureLine.h"
+#include "core/picture/PictureNames.h"
+#include "core/picture/Reels.h"
 
 #include <utility>
 
@@ -96,9 +96,9 @@ KeepPlan KeepPlanner::plan(const EventList& oldEvents, const EventList& newEvent
     plan.lost = black.lost();
     const std::vector<CarriedStretch> stretches = carried.stretches();
     restrictTo(spanOf(changedFrames(oldLine, newLine, black.material(), stretches)), joined(stretches), plan);
-    if (!reels.canBePaired() && !m_context.isForced)
-        plan.refusal = KeepRefusal{KeepRefusal::UnequalReels, reels.ofOld(), reels.ofNew(), {}};
-    else if (!black.outsideOfDay().empty())
+    if (!reels.canBePaired())
+        plan.questions.push_back({KeepRefusal::UnequalReels, reels.ofOld(), reels.ofNew(), {}});
+    if (!black.outsideOfDay().empty())
         plan.refusal = refusalFor(KeepRefusal::OutsideOfDay, united(black.outsideOfDay()));
     return plan;
 }
@@ -134,8 +134,8 @@ KeepPlan KeepPlanner::planGiven(const EventList& changeEvents) const
     }
     plan.lost = united(std::move(plan.lost));
     restrictTo(hull, std::move(events), plan);
-    if (!inTheWay.empty() && !m_context.isForced)
-        plan.refusal = refusalFor(KeepRefusal::MaterialInTheWay, inTheWay);
+    if (!inTheWay.empty())
+        plan.questions.push_back(refusalFor(KeepRefusal::MaterialInTheWay, inTheWay));
     return plan;
 }
 

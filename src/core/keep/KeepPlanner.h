@@ -26,9 +26,6 @@ struct KeepContext {
     std::vector<SecondsRange> material;
     /// What a run may change at most, in the same seconds.
     std::optional<SecondsRange> preserve;
-    /// The user has been asked: where reels can't be paired, what stands around them stays where it is; and material in
-    /// the way goes.
-    bool isForced = false;
 };
 
 /// Plans a run that leaves alone everything that the recut didn't change. A change EDL says which picture
@@ -51,8 +48,8 @@ public:
     KeepPlan plan(const EventList& oldEvents, const EventList& newEvents, const EventList& changeEvents) const;
 
     /// The plan for a change EDL that was given: its events as they are, and the hull of all its SRC and DST. Material in
-    /// the hull before the first SRC or after the last one is in the way: a refusal, unless forced. What stands in a gap
-    /// between the SRC goes as the list has it, and is told as lost.
+    /// the hull before the first SRC or after the last one is in the way: a question. What stands in a gap between the SRC
+    /// goes as the list has it, and is told as lost.
     KeepPlan planGiven(const EventList& changeEvents) const;
 
 private:

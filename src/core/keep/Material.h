@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 #include "core/time/Framerate.h"
 #include "core/time/SecondsRange.h"
 

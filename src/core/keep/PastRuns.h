@@ -3,7 +3,7 @@
 #pragma once
 
 #include "core/edl/EventList.h"
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 #include "core/settings/VfxPatternEntry.h"
 #include "core/time/Framerate.h"
 

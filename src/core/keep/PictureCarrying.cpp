@@ -6,6 +6,9 @@
 #include "core/edl/EventList.h"
 #include "core/keep/ChangeStretch.h"
 
+#include <algorithm>
+#include <utility>
+
 namespace cadrel::core {
 
 PictureCarrying::PictureCarrying(const PictureLine& oldLine, const PictureLine& newLine, const Reels& reels,
@@ -16,20 +19,17 @@ PictureCarrying::PictureCarrying(const PictureLine& oldLine, const PictureLine& 
 
 void PictureCarrying::run(const EventList& changeEvents, const Framerate& framerate)
 {
-    carryInPlace();
+    const std::vector<ChangeStretch> stretches = unhealedStretches(changeEvents, framerate);
     carryReelEnds();
-    carryChangeEvents(changeEvents, framerate);
+    carryLongerThanInPlace(stretches);
+    carryInPlace();
+    carryChangeEvents(changeEvents, stretches, framerate);
     carryHoles();
 }
 
-void PictureCarrying::carryInPlace()
-{
-    for (const FrameRange& reel : m_reels.ofNew())
-        carryEqual(0, reel, CarriedFrom::Unchanged);
-}
-
-// Material that stands twice can send a shot of the change EDL onto its twin. Where only one thing has changed, all
-// before it is as it was against the reel's start, and all after it against the reel's end.
+// Of material that stands twice, one place can have come to stand where the other was, and the change EDL can send a shot
+// onto its twin. Where only one thing has changed, all before it is as it was against the reel's start, and all after it
+// against the reel's end.
 void PictureCarrying::carryReelEnds()
 {
     for (const ReelPair& pair : m_reels.pairs()) {
@@ -39,18 +39,45 @@ void PictureCarrying::carryReelEnds()
         const FrameRange fromStart = common(pair.startShift());
         const FrameRanges afterHead = m_comparison.differencesUnder(pair.startShift(), fromStart);
         const std::int32_t headEnd = afterHead.empty() ? fromStart.end : afterHead.front().start;
-        carryEqual(pair.startShift(), {fromStart.start, headEnd}, CarriedFrom::Cut);
+        carryEqual(pair.startShift(), {fromStart.start, headEnd});
 
         const FrameRange upToEnd = common(pair.endShift());
         const FrameRanges beforeTail = m_comparison.differencesUnder(pair.endShift(), upToEnd);
         const std::int32_t tailStart = beforeTail.empty() ? upToEnd.start : beforeTail.back().end;
-        carryEqual(pair.endShift(), {tailStart, upToEnd.end}, CarriedFrom::Cut);
+        carryEqual(pair.endShift(), {tailStart, upToEnd.end});
     }
 }
 
-void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const Framerate& framerate)
+// Between two changes a frame can show what its twin happened to show there. That is less than the stretch it goes along with,
+// while a stretch that the change EDL sends onto its twin is less than what is the same around it.
+void PictureCarrying::carryLongerThanInPlace(const std::vector<ChangeStretch>& stretches)
 {
-    const std::vector<ChangeStretch> stretches = unhealedStretches(changeEvents, framerate);
+    std::vector<FrameRange> equal;
+    for (const FrameRange& reel : m_reels.ofNew()) {
+        for (const PicturePiece& piece : m_comparison.equalUnder(0, reel))
+            equal.push_back(piece.frames);
+    }
+    const FrameRanges inPlace = united(std::move(equal));
+    for (const ChangeStretch& stretch : joinedByShift(stretches)) {
+        const FrameRange& bounds = stretch.destination;
+        auto range = std::partition_point(inPlace.begin(), inPlace.end(),
+                                          [&bounds](const FrameRange& other) { return other.end <= bounds.start; });
+        for (; range != inPlace.end() && range->start < bounds.end; ++range) {
+            if (stretch.shift != 0 && bounds.length() > range->length())
+                carryEqual(stretch.shift, intersect(bounds, *range));
+        }
+    }
+}
+
+void PictureCarrying::carryInPlace()
+{
+    for (const FrameRange& reel : m_reels.ofNew())
+        carryEqual(0, reel);
+}
+
+void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const std::vector<ChangeStretch>& stretches,
+                                        const Framerate& framerate)
+{
     // Of several layers that claim one frame, that one is right under which the whole picture is the same.
     for (const ChangeStretch& stretch : stretches)
         carryEqual(stretch.shift, stretch.destination, CarriedFrom::Cut);
@@ -64,6 +91,11 @@ void PictureCarrying::carryChangeEvents(const EventList& changeEvents, const Fra
             m_carried.carry(m_comparison.litUnder(stretch->shift, stretch->destination), stretch->shift,
                             CarriedFrom::Cut);
     }
+}
+
+void PictureCarrying::carryEqual(std::int32_t shift, const FrameRange& bounds)
+{
+    carryEqual(shift, bounds, shift == 0 ? CarriedFrom::Unchanged : CarriedFrom::Cut);
 }
 
 void PictureCarrying::carryHoles()

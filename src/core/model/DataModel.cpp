@@ -23,15 +23,31 @@ namespace {
 
 constexpr std::uint32_t PersistenceVersion = 1;
 
+using Events = std::vector<std::shared_ptr<EventBase>>;
+
+/// Those of the events that are in the list.
+std::unordered_set<const EventBase*> membersOf(const EventList& list, const Events& events)
+{
+    std::unordered_set<const EventBase*> wanted;
+    for (const auto& event : events)
+        wanted.insert(event.get());
+    std::unordered_set<const EventBase*> members;
+    for (const auto& event : list.events()) {
+        if (wanted.contains(event.get()))
+            members.insert(event.get());
+    }
+    return members;
+}
+
 /// The events of a programme that play from `in` to `out`, each once, in the map's order.
-std::vector<std::shared_ptr<EventBase>> eventsPlaying(const CutMap& programme, const Timecode& in, const Timecode& out)
+Events eventsPlaying(const CutMap& programme, const Timecode& in, const Timecode& out)
 {
     // Shrunk, so that a neighbour that merely touches isn't hit.
     const double start = in.toSeconds() + SameInstant;
     const double end = out.toSeconds() - SameInstant;
     if (start > end)
         throw Result::InvalidArgument;
-    std::vector<std::shared_ptr<EventBase>> events;
+    Events events;
     std::unordered_set<const EventBase*> known;
     for (const auto& reference : programme.eventsInDestinationRange(start, end)) {
         std::shared_ptr<EventBase> event(reference);
@@ -191,17 +207,53 @@ std::vector<EventList> DataModel::newEventsFor(const std::vector<std::shared_ptr
     return eventsFor(changeEvents, m_newEdl, &EventBase::dstIn, &EventBase::dstOut);
 }
 
+std::vector<std::shared_ptr<EventBase>>
+DataModel::oldEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const
+{
+    return eventsBehind(changeEvents, m_oldEdl, &EventBase::srcIn, &EventBase::srcOut);
+}
+
+std::vector<std::shared_ptr<EventBase>>
+DataModel::newEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const
+{
+    return eventsBehind(changeEvents, m_newEdl, &EventBase::dstIn, &EventBase::dstOut);
+}
+
+template <class Take>
+void DataModel::forEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents, const EventList& programme,
+                                TimecodeOf in, TimecodeOf out, const Take& take) const
+{
+    const std::unordered_set<const EventBase*> members = membersOf(m_changeEdl, changeEvents);
+    const CutMap map(programme, Timecode::framerate());
+    for (std::size_t index = 0; index < changeEvents.size(); ++index) {
+        const std::shared_ptr<EventBase>& change = changeEvents[index];
+        if (members.contains(change.get()) && !change->hasFlaw(EventFlaw::TimecodeInvalid) &&
+            change->srcIn() < change->srcOut() && change->dstIn() < change->dstOut())
+            take(index, eventsPlaying(map, (change.get()->*in)(), (change.get()->*out)()));
+    }
+}
+
 std::vector<EventList> DataModel::eventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents,
                                             const EventList& programme, TimecodeOf in, TimecodeOf out) const
 {
-    const CutMap changes(m_changeEdl, Timecode::framerate());
-    const CutMap map(programme, Timecode::framerate());
     std::vector<EventList> found(changeEvents.size());
-    for (std::size_t index = 0; index < changeEvents.size(); ++index) {
-        const std::shared_ptr<EventBase>& change = changeEvents[index];
-        if (changes.contains(change) && change->srcIn() < change->srcOut() && change->dstIn() < change->dstOut())
-            found[index].append(eventsPlaying(map, (change.get()->*in)(), (change.get()->*out)()));
-    }
+    forEventsBehind(changeEvents, programme, in, out,
+                    [&](std::size_t index, Events&& events) { found[index].append(std::move(events)); });
+    return found;
+}
+
+std::vector<std::shared_ptr<EventBase>>
+DataModel::eventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents, const EventList& programme,
+                        TimecodeOf in, TimecodeOf out) const
+{
+    Events found;
+    std::unordered_set<const EventBase*> known;
+    forEventsBehind(changeEvents, programme, in, out, [&](std::size_t, Events&& events) {
+        for (auto& event : events) {
+            if (known.insert(event.get()).second)
+                found.push_back(std::move(event));
+        }
+    });
     return found;
 }
 

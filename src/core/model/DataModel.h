@@ -99,6 +99,11 @@ public:
     /// The same for many change events at one go, a list for each. Every EDL is sorted once.
     std::vector<EventList> oldEventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const;
     std::vector<EventList> newEventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const;
+    /// The events of all those lists, each once, in no list that would listen to them.
+    std::vector<std::shared_ptr<EventBase>>
+    oldEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const;
+    std::vector<std::shared_ptr<EventBase>>
+    newEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents) const;
     /// Works out the flaws of all events again after a change of the project's frame rate; sends one
     /// DataModelChangeContext.
     void revalidateEvents();
@@ -124,9 +129,15 @@ private:
     util::Result::Type generateAndHeal(const GenerationFailureListener& onFailure);
     std::array<ChangeContextNotificationBase*, 5> sources();
     using TimecodeOf = const Timecode& (EventBase::*)() const;
-    /// For each change event the events of an EDL that play in its range on one side.
+    /// Calls `take` with the index of each change event that has a range, and with the events of an EDL that play in it.
+    template <class Take>
+    void forEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents, const EventList& programme,
+                         TimecodeOf in, TimecodeOf out, const Take& take) const;
     std::vector<EventList> eventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents,
                                      const EventList& programme, TimecodeOf in, TimecodeOf out) const;
+    std::vector<std::shared_ptr<EventBase>> eventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents,
+                                                         const EventList& programme, TimecodeOf in,
+                                                         TimecodeOf out) const;
     void readMembers(serialize::ByteArchive& archive);
     void finishReading(util::Result::Type result, bool notifies);
 

@@ -6,6 +6,7 @@
 #include "core/notes/NoteStep.h"
 #include "core/notes/PictureRules.h"
 #include "core/notes/Programme.h"
+#include "core/picture/TextNumbers.h"
 
 #include <cstddef>
 #include <cstdint>

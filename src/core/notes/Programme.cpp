@@ -6,8 +6,8 @@
 #include "core/edl/EventList.h"
 #include "core/edl/MatchedName.h"
 #include "core/edl/ProgrammePlace.h"
-#include "core/keep/Reels.h"
 #include "core/notes/EventPicture.h"
+#include "core/picture/Reels.h"
 
 #include <algorithm>
 #include <queue>

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/notes/PictureRules.h"
+#include "core/picture/TextNumbers.h"
 
 #include <cstddef>
 #include <cstdint>

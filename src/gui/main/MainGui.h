@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/notify/ChangeContextListenerInterface.h"
+#include "gui/look/LookAndFeel.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
@@ -35,6 +36,7 @@ public:
     void paint(juce::Graphics& graphics) override;
 
 private:
+    juce::SharedResourcePointer<LookAndFeel> m_look; ///< all windows share it
     core::CadrelerBase* m_engine = nullptr;
     core::ChangeContextNotificationBase* m_notifier = nullptr;
     VideoProviderBase* m_video = nullptr;

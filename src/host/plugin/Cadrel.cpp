@@ -37,6 +37,15 @@ bool isEqual(const char* text, const char* expected)
     return text && std::strcmp(text, expected) == 0;
 }
 
+/// The answer of a call that may throw.
+template <class Call>
+int32 guarded(Call call)
+{
+    int32 answer = ResultOk;
+    const Result::Type thrown = resultOf([&] { answer = call(); });
+    return thrown == Result::Ok ? answer : thrown;
+}
+
 BundleHandle bundle()
 {
     return ModuleState::get().moduleHandle();
@@ -116,7 +125,7 @@ int32 Cadrel::handleAction(const char* category, const char* action, bool show)
 {
     if (!isEqual(category, ActionCategory) || !isEqual(action, ActionName))
         return ResultFalse;
-    return showDialog(show);
+    return guarded([&] { return showDialog(show); });
 }
 
 int32 Cadrel::showDialog(bool show)
@@ -144,7 +153,7 @@ int32 Cadrel::openWindow()
     }
     m_window = window.get();
     window->setCloseNotification(this);
-    if (const int32 result = window->open(); result != ResultOk) {
+    if (const int32 result = guarded([&] { return window->open(); }); result != ResultOk) {
         window->setCloseNotification(nullptr);
         m_window = nullptr;
         disposeView();
@@ -218,7 +227,7 @@ bool Cadrel::hasWindow(IHostWindow* window)
 IHostWindow* Cadrel::getWindow()
 {
     if (!m_window)
-        openWindow();
+        guarded([&] { return openWindow(); });
     return m_window;
 }
 

@@ -9,7 +9,10 @@
 #include <X11/keysym.h>
 
 #include <algorithm>
+#include <clocale>
+#include <cstddef>
 #include <set>
+#include <string>
 #include <vector>
 
 namespace cadrel::host {
@@ -21,29 +24,83 @@ struct WaitingKey {
     bool isServed; ///< JUCE has had it at the end of this serving
 };
 
+/// The locale of the user, in which JUCE takes the characters of keys from Xlib. A host needn't have taken it over.
+class UserLocale {
+public:
+    UserLocale() : m_before(std::setlocale(LC_CTYPE, nullptr)) { std::setlocale(LC_CTYPE, ""); }
+    UserLocale(const UserLocale&) = delete;
+    UserLocale& operator=(const UserLocale&) = delete;
+    ~UserLocale() { std::setlocale(LC_CTYPE, m_before.c_str()); }
+
+private:
+    std::string m_before;
+};
+
+/// What Xlib makes of a press.
+struct LookedUpKey {
+    KeySym symbol = NoSymbol;
+    wchar_t character = 0; ///< 0 for none
+
+    explicit LookedUpKey(::XKeyEvent event)
+    {
+        const UserLocale locale;
+        char text[64] = {};
+        XLookupString(&event, text, sizeof text - 1, &symbol, nullptr);
+        character = *juce::CharPointer_UTF8(text);
+    }
+};
+
+bool isWithin(KeySym symbol, KeySym first, KeySym last)
+{
+    return symbol >= first && symbol <= last;
+}
+
 /// The key of the same name that isn't on the keypad.
 KeySym withoutKeypad(KeySym symbol)
 {
-    if (symbol >= XK_KP_Home && symbol <= XK_KP_End)
+    if (isWithin(symbol, XK_KP_Home, XK_KP_End))
         return symbol - XK_KP_Home + XK_Home;
     if (symbol == XK_KP_Insert)
         return XK_Insert;
     return symbol == XK_KP_Delete ? KeySym{XK_Delete} : symbol;
 }
 
-/// JUCE takes a key's character from Xlib in the same way. The codes of its keys without one end as their symbols do.
-bool isKey(::XKeyEvent event, int code, wchar_t character)
+bool isLatin1(KeySym symbol)
 {
-    constexpr KeySym NamedKeys = 0xff00;
-    constexpr KeySym LastByte = 0xff;
-    char text[64] = {};
-    KeySym symbol = NoSymbol;
-    XLookupString(&event, text, sizeof text - 1, &symbol, nullptr);
-    const wchar_t found = *juce::CharPointer_UTF8(text);
-    if (found != 0 || character != 0)
-        return found == character;
+    return symbol <= 0xff;
+}
+
+/// One that JUCE knows by its name, and not by a character.
+bool isNamed(KeySym symbol)
+{
     const KeySym named = withoutKeypad(symbol);
-    return (named & NamedKeys) == NamedKeys && (named & LastByte) == (static_cast<KeySym>(code) & LastByte);
+    return isWithin(named, XK_Home, XK_End) || named == XK_Insert || named == XK_Delete ||
+           isWithin(named, XK_F1, XK_F35);
+}
+
+/// Whether a press is that key of JUCE's. The codes of its named keys end as their symbols do.
+bool isKey(const ::XKeyEvent& event, int code, wchar_t character)
+{
+    constexpr KeySym LastByte = 0xff;
+    const LookedUpKey key(event);
+    if (key.character != 0 || character != 0)
+        return key.character == character;
+    if (isLatin1(key.symbol))
+        return key.symbol == static_cast<KeySym>(code);
+    return isNamed(key.symbol) && (withoutKeypad(key.symbol) & LastByte) == (static_cast<KeySym>(code) & LastByte);
+}
+
+/// Whether a press means nothing by itself: it changes what the next one means, or moves the keyboard to another field.
+bool isForOthers(KeySym symbol)
+{
+    return IsModifierKey(symbol) || symbol == XK_ISO_Left_Tab || isWithin(symbol, XK_Multi_key, XK_PreviousCandidate);
+}
+
+/// Whether JUCE hands a press to no component, so that none can have used it.
+bool isLeftOut(const ::XKeyEvent& event)
+{
+    const LookedUpKey key(event);
+    return key.character == 0 && !isLatin1(key.symbol) && !isNamed(key.symbol) && !isForOthers(key.symbol);
 }
 
 bool isPressOf(const WaitingKey& key, unsigned int keycode)
@@ -64,12 +121,36 @@ void send(::Display* display, ::Window window, const ::XKeyEvent& key)
 } // namespace
 
 struct UnusedKeys::Keys {
+    ::Display* display;
+    ::Window parent;
     std::vector<WaitingKey> waiting; ///< the oldest first
     std::set<unsigned int> sent;     ///< keycodes whose press was sent on, and whose release wasn't yet
+
+    void sendPress(const ::XKeyEvent& press)
+    {
+        send(display, parent, press);
+        sent.insert(press.keycode);
+    }
+    /// JUCE has dealt with the presses among the first so many, and used those that it hasn't left out.
+    void settlePresses(std::ptrdiff_t count)
+    {
+        const auto end = waiting.begin() + count;
+        const auto kept = std::remove_if(waiting.begin(), end, [this](const WaitingKey& key) {
+            if (key.event.type == KeyPress && isLeftOut(key.event))
+                sendPress(key.event);
+            return key.event.type == KeyPress;
+        });
+        waiting.erase(kept, end);
+    }
+    void sendRelease(const ::XKeyEvent& release)
+    {
+        if (sent.erase(release.keycode) > 0)
+            send(display, parent, release);
+    }
 };
 
 UnusedKeys::UnusedKeys(XConnection::Window ours, XConnection::Window parent)
-    : m_parent(parent), m_keys(std::make_unique<Keys>())
+    : m_keys(std::make_unique<Keys>(Keys{m_connection.display(), parent, {}, {}}))
 {
     if (!m_connection.isOpen())
         return;
@@ -92,9 +173,11 @@ void UnusedKeys::sendOn(int code, wchar_t character)
     });
     if (found == waiting.end())
         return;
-    send(m_connection.display(), m_parent, found->event);
-    m_keys->sent.insert(found->event.keycode);
+    const ::XKeyEvent press = found->event;
+    const auto before = found - waiting.begin();
     waiting.erase(found);
+    m_keys->settlePresses(before);
+    m_keys->sendPress(press);
     settleReleases();
 }
 
@@ -109,7 +192,7 @@ void UnusedKeys::beginServing()
 
 void UnusedKeys::endServing()
 {
-    std::erase_if(m_keys->waiting, [](const WaitingKey& key) { return key.isServed && key.event.type == KeyPress; });
+    m_keys->settlePresses(std::ranges::count_if(m_keys->waiting, &WaitingKey::isServed));
     settleReleases();
 }
 
@@ -137,8 +220,7 @@ void UnusedKeys::settleReleases()
             ++key;
             continue;
         }
-        if (m_keys->sent.erase(keycode) > 0)
-            send(m_connection.display(), m_parent, key->event);
+        m_keys->sendRelease(key->event);
         key = waiting.erase(key);
     }
 }

@@ -23,7 +23,8 @@ public:
 
     /// Sends the first press that is this key of JUCE's, by its code and its character or 0; and its release when that comes.
     void sendOn(int code, wchar_t character);
-    /// Around each serving of JUCE: what it hasn't left over by the end it has used.
+    /// Around each serving of JUCE: what it hasn't left over by the end it has used, but for the keys that it hands to no
+    /// component, which are sent on.
     void beginServing();
     void endServing();
 
@@ -35,7 +36,6 @@ private:
     void settleReleases();
 
     XConnection m_connection;
-    XConnection::Window m_parent;
     std::unique_ptr<Keys> m_keys;
 };
 

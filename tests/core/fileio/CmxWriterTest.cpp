@@ -120,6 +120,25 @@ TEST(CmxWriter, WritesNeitherClipNamesNorComments)
     EXPECT_EQ(textOf(events), "TITLE:   reel.edl\n001  AX       V     C        " + Timecodes + "\n");
 }
 
+TEST(CmxWriter, KeepsAFileThatStandsThereWhereThatIsAskedFor)
+{
+    const TempFolder folder;
+    const EventList events = listOfCuts(1000);
+    folder.write("reel_2.edl", "of another program");
+    const auto write = [&](const EventList& list, CmxWriter::Existing existing) {
+        return CmxWriter(CmxWriter::FrameCountMode::Unsaid, existing).write(widePath(folder / "reel.edl"), list);
+    };
+
+    EXPECT_EQ(write(events, CmxWriter::Existing::Kept), Result::Refused);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"reel_2.edl"}));
+    EXPECT_EQ(contentOf(folder / "reel_2.edl"), "of another program");
+    EXPECT_EQ(write(listOfCuts(1), CmxWriter::Existing::Kept), Result::Ok);
+    EXPECT_EQ(write(listOfCuts(2), CmxWriter::Existing::Kept), Result::Refused);
+    EXPECT_EQ(contentOf(folder / "reel.edl"), textOf(listOfCuts(1)));
+    EXPECT_EQ(write(events, CmxWriter::Existing::Replaced), Result::Ok);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"reel.edl", "reel_1.edl", "reel_2.edl"}));
+}
+
 TEST(CmxWriter, LeavesAnInvalidEventOutButCountsIt)
 {
     EventList events = listOfCuts(3);

@@ -3,12 +3,12 @@
 #include "core/keep/BlackCarrying.h"
 
 #include "tests/core/keep/KeepFilm.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/core/TestProject.h"
 
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <chrono>
 #include <vector>
 
 namespace cadrel::tests {
@@ -106,11 +106,10 @@ TEST_F(BlackCarryingTest, TwiceTheChangeEventsTakeAboutTwiceTheTime)
             material.push_back({2 * index, 2 * index + 1});
             changes.push_back({material.back().shiftedBy(shift), shift});
         }
-        const auto start = std::chrono::steady_clock::now();
-        run({}, {{0, shift}}, material, changes);
+        const double seconds = secondsOf([&] { run({}, {{0, shift}}, material, changes); });
         EXPECT_EQ(m_carried.stretches().size(), static_cast<std::size_t>(count));
         EXPECT_TRUE(m_lost.empty());
-        return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+        return seconds;
     };
 
     // With 86,400 frames in this day, there is room for 20,000 pieces at both places.

@@ -81,17 +81,42 @@ bool FrameModel::isEqual(std::int32_t newFrame, std::int32_t shift) const
     return newSame.start == oldSame.start || newSame.end == oldSame.end;
 }
 
-std::vector<FrameRange> FrameModel::newReels() const
+std::vector<FrameRange> FrameModel::reelsOf(const Pictures& pictures)
 {
     std::vector<FrameRange> reels;
     for (std::int32_t frame = 0; frame < Length; ++frame) {
-        if (isNewBlack(frame))
+        if (pictureAt(pictures, frame).empty())
             continue;
         if (reels.empty() || frame - reels.back().end >= 60)
             reels.push_back({frame, frame});
         reels.back().end = frame + 1;
     }
     return reels;
+}
+
+bool FrameModel::isEqualOrBlack(std::int32_t newFrame, std::int32_t shift) const
+{
+    return isEqual(newFrame, shift) || (isNewBlack(newFrame) && isOldBlack(newFrame - shift));
+}
+
+bool FrameModel::goesAlongWithAnEnd(std::int32_t newFrame) const
+{
+    const std::vector<FrameRange> before = oldReels();
+    const std::vector<FrameRange> after = newReels();
+    for (std::size_t index = 0; before.size() == after.size() && index < after.size(); ++index) {
+        if (!after[index].contains(newFrame))
+            continue;
+        const std::int32_t startShift = after[index].start - before[index].start;
+        bool isAsFromStart = true;
+        for (std::int32_t frame = after[index].start; frame <= newFrame; ++frame)
+            isAsFromStart = isAsFromStart && isEqualOrBlack(frame, startShift);
+        const std::int32_t endShift = after[index].end - before[index].end;
+        bool isAsFromEnd = true;
+        for (std::int32_t frame = newFrame; frame < after[index].end; ++frame)
+            isAsFromEnd = isAsFromEnd && isEqualOrBlack(frame, endShift);
+        return isAsFromStart || isAsFromEnd;
+    }
+    return false;
 }
 
 } // namespace cadrel::tests

@@ -3,7 +3,7 @@
 #pragma once
 
 #include "core/edl/EventList.h"
-#include "core/keep/FrameRange.h"
+#include "core/picture/FrameRange.h"
 
 #include <cstdint>
 #include <string>
@@ -27,8 +27,12 @@ public:
     bool isNewBlack(std::int32_t frame) const { return pictureAt(m_new, frame).empty(); }
     /// Whether the new picture at a frame equals the old one `shift` frames before; black equals nothing.
     bool isEqual(std::int32_t newFrame, std::int32_t shift) const;
-    /// The stretches of new picture that stand 60 frames or more apart.
-    std::vector<core::FrameRange> newReels() const;
+    /// The stretches of picture that stand 60 frames or more apart.
+    std::vector<core::FrameRange> oldReels() const { return reelsOf(m_old); }
+    std::vector<core::FrameRange> newReels() const { return reelsOf(m_new); }
+    /// Whether old and new reels can be paired, and the new frame is as far from the start of its reel, or from its end, as
+    /// it was before, together with all frames from there to it.
+    bool goesAlongWithAnEnd(std::int32_t newFrame) const;
 
 private:
     struct Layer {
@@ -44,6 +48,8 @@ private:
     static Pictures picturesOf(const core::EventList& events);
     static const Picture& pictureAt(const Pictures& pictures, std::int32_t frame);
     static bool isStill(const Picture& picture);
+    static std::vector<core::FrameRange> reelsOf(const Pictures& pictures);
+    bool isEqualOrBlack(std::int32_t newFrame, std::int32_t shift) const;
     /// The frames around one that show just the same.
     static core::FrameRange sameAround(const Pictures& pictures, std::int32_t frame);
 

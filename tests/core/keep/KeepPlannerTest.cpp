@@ -53,6 +53,7 @@ TEST_F(KeepPlannerTest, TheSameCutNeedsNoRunWhateverStandsAroundIt)
 
     EXPECT_EQ(hullOf(plan), "none");
     EXPECT_FALSE(plan.needsRun());
+    EXPECT_TRUE(plan.questions.empty());
     EXPECT_FALSE(plan.refusal);
     EXPECT_EQ(linesOf(plan.events), Lines());
     EXPECT_EQ(linesOf(plan.lost), Lines());
@@ -136,6 +137,46 @@ TEST_F(KeepPlannerTest, AfterOneChangeAShotDoesNotGoToItsTwinEither)
 
 //  old    |--- A ---|- F -|-- B --|
 //  new    |X|--- A ---|- F -|- B -|
+// The second A shows at frame 1120 what the first one, moved by 30, shows there in the new cut.
+TEST_F(KeepPlannerTest, AfterOneChangeNoFrameStaysWhereItsTwinHappenedToStand)
+{
+    const Film before = Film().at(1000).shot("X", 0, 70).shot("A", 0, 30).shot("B", 0, 20).shot("A", 20, 40);
+    const Film after = before.withInsertBefore(1, "N", 30);
+
+    const KeepPlan plan = planFor(before, after);
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1070..1160 to 1100..1190: cut"}));
+    EXPECT_EQ(hullOf(plan), "1070..1190");
+}
+
+TEST_F(KeepPlannerTest, BetweenTwoChangesNoFrameStaysWhereItsTwinHappenedToStandEither)
+{
+    const Film before =
+        Film().at(1000).shot("X", 0, 70).shot("A", 0, 30).shot("B", 0, 20).shot("A", 20, 40).shot("C", 0, 60);
+    const Film after = before.withInsertBefore(4, "M", 10).withInsertBefore(1, "N", 30);
+
+    const KeepPlan plan = planFor(before, after);
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1070..1160 to 1100..1190: cut", "1160..1220 to 1200..1260: cut"}));
+}
+
+TEST_F(KeepPlannerTest, WhatIsEqualAtTheSameTimeStaysUnlessTheChangeEdlCarriesALongerStretch)
+{
+    const Film before =
+        Film().at(1000).shot("S", 0, 5).shot("A", 0, 10).shot("T", 0, 5).shot("A", 0, 11).shot("U", 0, 5);
+    const auto planWith = [&](std::int32_t length, const char* srcOut, const char* dstOut) {
+        const Film after = Film().at(1000).shot("V", 0, 5).shot("A", 0, length).shot("W", 0, 31 - length);
+        EventList changes;
+        changes.add(makeEvent("A", "00:17:00:00", srcOut, "00:16:45:00", dstOut));
+        return KeepPlanner(contextWith()).plan(before.list(), after.list(), changes);
+    };
+
+    EXPECT_EQ(linesOf(planWith(10, "00:17:10:00", "00:16:55:00").untouched), Lines());
+    EXPECT_EQ(linesOf(planWith(10, "00:17:10:00", "00:16:55:00").events),
+              (Lines{"1005..1015 to 1005..1015: unchanged"}));
+    EXPECT_EQ(linesOf(planWith(11, "00:17:11:00", "00:16:56:00").events), (Lines{"1020..1031 to 1005..1016: cut"}));
+}
+
 TEST_F(KeepPlannerTest, AFreezeGoesOnWithTheShotBeforeIt)
 {
     const Film before = Film().at(1000).shot("A", 0, 100).freeze("F", 7, 20).shot("B", 0, 50);
@@ -465,20 +506,20 @@ TEST_F(KeepPlannerTest, UnequalNumbersOfReelsAreAQuestion)
 
     const KeepPlan plan = planFor(before, after);
 
-    ASSERT_TRUE(plan.refusal);
-    EXPECT_EQ(plan.refusal->reason, KeepRefusal::UnequalReels);
-    EXPECT_EQ(linesOf(plan.refusal->oldReels), (Lines{"1000..1100", "1160..1210"}));
-    EXPECT_EQ(linesOf(plan.refusal->newReels), (Lines{"1000..1209"}));
+    ASSERT_EQ(plan.questions.size(), 1U);
+    EXPECT_EQ(plan.questions.front().reason, KeepRefusal::UnequalReels);
+    EXPECT_EQ(linesOf(plan.questions.front().oldReels), (Lines{"1000..1100", "1160..1210"}));
+    EXPECT_EQ(linesOf(plan.questions.front().newReels), (Lines{"1000..1209"}));
+    EXPECT_FALSE(plan.refusal);
 }
 
-TEST_F(KeepPlannerTest, WhereReelsCannotBePairedAForcedPlanLeavesBlackInItsPlace)
+TEST_F(KeepPlannerTest, WhereReelsCannotBePairedBlackStaysInItsPlace)
 {
     const Film before = Film().at(1000).shot("A", 0, 100).black(60).shot("B", 0, 50);
     const Film after = Film().at(1000).shot("A", 0, 100).black(59).shot("B", 0, 50);
 
-    const KeepPlan plan = planFor(before, after, {{1100, 1110}, {1210, 1215}}, true);
+    const KeepPlan plan = planFor(before, after, {{1100, 1110}, {1210, 1215}});
 
-    EXPECT_FALSE(plan.refusal);
     EXPECT_EQ(linesOf(plan.events), (Lines{"1160..1210 to 1159..1209: cut"}));
     EXPECT_EQ(linesOf(plan.lost), Lines());
 }
@@ -556,7 +597,7 @@ TEST_F(KeepPlannerTest, AGivenChangeEdlIsTakenAsItIsWithinTheHullOfBothSides)
 
     const KeepPlan plan = KeepPlanner(contextWith({{0, 5}, {20, 70}, {100, 110}})).planGiven(changes);
 
-    EXPECT_FALSE(plan.refusal);
+    EXPECT_TRUE(plan.questions.empty());
     EXPECT_EQ(linesOf(plan.events), (Lines{"60..70 to 20..30: cut", "10..20 to 30..40: cut"}));
     EXPECT_EQ(hullOf(plan), "10..70");
 }
@@ -571,7 +612,7 @@ TEST_F(KeepPlannerTest, WhatStandsInAGapOfTheSourcesOfAGivenChangeEdlIsToldAsLos
 
     const KeepPlan plan = KeepPlanner(contextWith({{0, 22}, {25, 28}, {29, 50}})).planGiven(changes);
 
-    EXPECT_FALSE(plan.refusal);
+    EXPECT_TRUE(plan.questions.empty());
     EXPECT_EQ(linesOf(plan.lost), (Lines{"20..30"})); // told once, from the first to the last
     EXPECT_EQ(linesOf(KeepPlanner(contextWith({{0, 20}, {25, 28}, {30, 50}})).planGiven(changes).lost),
               (Lines{"25..28"}));
@@ -588,31 +629,28 @@ TEST_F(KeepPlannerTest, WhatStandsBetweenTheOldAndTheNewPlaceOfAGivenChangeEdlIs
         return KeepPlanner(contextWith({{10, 20}, material})).planGiven(changes);
     };
 
-    ASSERT_TRUE(planWith({20, 21}).refusal);
-    EXPECT_EQ(planWith({20, 21}).refusal->reason, KeepRefusal::MaterialInTheWay);
-    EXPECT_EQ(planWith({20, 21}).refusal->amount(), 1);
+    ASSERT_EQ(planWith({20, 21}).questions.size(), 1U);
+    EXPECT_EQ(planWith({20, 21}).questions.front().reason, KeepRefusal::MaterialInTheWay);
+    EXPECT_EQ(planWith({20, 21}).questions.front().amount(), 1);
     EXPECT_EQ(linesOf(planWith({25, 45}).lost), (Lines{"25..45"}));
-    EXPECT_TRUE(planWith({49, 60}).refusal);
-    EXPECT_FALSE(planWith({50, 60}).refusal);
-    EXPECT_FALSE(planWith({5, 10}).refusal);
+    EXPECT_FALSE(planWith({49, 60}).questions.empty());
+    EXPECT_TRUE(planWith({50, 60}).questions.empty());
+    EXPECT_TRUE(planWith({5, 10}).questions.empty());
 }
 
-TEST_F(KeepPlannerTest, MaterialInTheWayOfAGivenChangeEdlIsRefusedWithItsAmount)
+TEST_F(KeepPlannerTest, MaterialInTheWayOfAGivenChangeEdlIsAQuestionWithItsAmount)
 {
     EventList changes;
     changes.add(makeEvent("A", "00:00:10:00", "00:00:20:00", "00:00:15:00", "00:00:25:00"));
-    KeepContext context = contextWith({{12, 22}, {24, 90}});
 
-    const KeepPlan refused = KeepPlanner(context).planGiven(changes);
-    context.isForced = true;
-    const KeepPlan forced = KeepPlanner(context).planGiven(changes);
+    const KeepPlan plan = KeepPlanner(contextWith({{12, 22}, {24, 90}})).planGiven(changes);
 
-    ASSERT_TRUE(refused.refusal);
-    EXPECT_EQ(refused.refusal->reason, KeepRefusal::MaterialInTheWay);
-    EXPECT_EQ(refused.refusal->amount(), 3);
-    EXPECT_FALSE(forced.refusal);
-    EXPECT_EQ(linesOf(forced.lost), (Lines{"20..22", "24..25"}));
-    EXPECT_EQ(hullOf(forced), "10..25");
+    ASSERT_EQ(plan.questions.size(), 1U);
+    EXPECT_EQ(plan.questions.front().reason, KeepRefusal::MaterialInTheWay);
+    EXPECT_EQ(plan.questions.front().amount(), 3);
+    EXPECT_FALSE(plan.refusal);
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"20..22", "24..25"}));
+    EXPECT_EQ(hullOf(plan), "10..25");
 }
 
 //  old    |-- A --|- BL -|-- B --|
@@ -640,6 +678,58 @@ TEST_F(KeepPlannerTest, SoundInBlackBehindALiftedShotGoesAlongWithTheShotAfterIt
     EXPECT_EQ(linesOf(plan.events), (Lines{"1130..1190 to 1100..1160: black cut"}));
     EXPECT_EQ(hullOf(plan), "1100..1190");
     EXPECT_EQ(linesOf(plan.lost), Lines());
+}
+
+//  old           |-- A --|- X -| sound |------- Y -------|-- B --|
+//  new   (here)  |-- A --|-- B --|
+TEST_F(KeepPlannerTest, SoundInTheBlackOfALiftedSceneDoesNotGoInFrontOfTheReel)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("X", 0, 30).black(10).shot("Y", 0, 140).shot("B", 0, 50);
+
+    const KeepPlan plan = planFor(before, filmOfAAndB(), {{1130, 1140}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1280..1330 to 1100..1150: cut"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"1130..1140"}));
+}
+
+//  old   |-- A --|- X -| sound |- Y -|-- B --|
+//  new   |-- A --|-- B --|     (here)
+TEST_F(KeepPlannerTest, SoundInTheBlackOfALiftedSceneDoesNotStayBehindTheReel)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("X", 0, 60).black(10).shot("Y", 0, 10).shot("B", 0, 50);
+
+    const KeepPlan plan = planFor(before, filmOfAAndB(), {{1160, 1170}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1180..1230 to 1100..1150: cut"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"1160..1170"}));
+}
+
+//  old   |-- A --|- X -| sound |- Y -|- B -| other |- C -|
+//  new   |-- A --|- B -| other |- C -|
+TEST_F(KeepPlannerTest, SoundInTheBlackOfALiftedSceneDoesNotTakeTheRoomOfThatAfterIt)
+{
+    const Film rest = Film().at(1100).shot("B", 0, 30).black(10).shot("C", 0, 20);
+    const Film before =
+        Film().at(1000).shot("A", 0, 100).shot("X", 0, 30).black(10).shot("Y", 0, 10).append(rest, 1100);
+    const Film after = Film().at(1000).shot("A", 0, 100).append(rest, 1100);
+
+    const KeepPlan plan = planFor(before, after, {{1130, 1140}, {1180, 1190}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1150..1210 to 1100..1160: cut black cut"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"1130..1140"}));
+}
+
+//  old   |-- A --|- X -| sound |- Y -|-- B --|
+//  new   |-- A --|- P -| sound |- Q -|-- B --|
+TEST_F(KeepPlannerTest, SoundInBlackBetweenTwoShotsThatWereReplacedStays)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100).shot("X", 0, 30).black(10).shot("Y", 0, 10).shot("B", 0, 50);
+    const Film after = Film().at(1000).shot("A", 0, 100).shot("P", 0, 30).black(10).shot("Q", 0, 10).shot("B", 0, 50);
+
+    const KeepPlan plan = planFor(before, after, {{1130, 1140}});
+
+    EXPECT_EQ(linesOf(plan.lost), Lines());
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1130..1140 to 1130..1140: black"}));
 }
 
 TEST_F(KeepPlannerTest, WhatWouldStayIsLostWhereNewPictureIsPushedOverIt)

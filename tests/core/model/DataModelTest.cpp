@@ -634,6 +634,19 @@ TEST_F(BehindAChange, OtherFlawsDoNotMatter)
     EXPECT_EQ(model.oldEventsFor(event).events(), Events{b});
 }
 
+TEST_F(BehindAChange, StandTheEventsOfManyChangesOnceEach)
+{
+    const auto first = change("00:00:15:00", "00:00:25:00", "00:01:50:00", "00:02:00:00");
+    const auto second = change("00:00:20:00", "00:00:35:00", "00:02:00:00", "00:02:15:00");
+    const auto flawed = change("00:00:00:00", "00:00:01:00", "00:01:50:00", "00:02:00:25");
+    const std::vector<std::shared_ptr<EventBase>> changes = {second, nullptr, flawed, first, b};
+
+    EXPECT_EQ(model.oldEventsBehind(changes), (Events{b, c, a}));
+    EXPECT_EQ(model.newEventsBehind(changes), (Events{y, z, x}));
+    EXPECT_TRUE(model.oldEventsBehind({}).empty());
+    EXPECT_TRUE(model.newEventsBehind({b, y}).empty());
+}
+
 TEST_F(BehindAChange, ARangeShorterThanTheToleranceFails)
 {
     const auto event = change("00:00:22:00", "00:00:22:01", "00:02:00:00", "00:02:00:01");

@@ -5,6 +5,7 @@
 #include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextNotificationBase.h"
+#include "tests/support/x11/VirtualScreen.h"
 
 #include <gtest/gtest.h>
 
@@ -15,7 +16,9 @@ using cadrel::core::ChangeContextListenerInterface;
 using cadrel::core::ChangeContextNotificationBase;
 using cadrel::core::DataModel;
 using cadrel::core::DataModelChangeContext;
+using cadrel::gui::LookAndFeel;
 using cadrel::gui::MainGui;
+using cadrel::tests::NoScreen;
 
 namespace {
 
@@ -37,6 +40,7 @@ public:
 
 class MainGuiTest : public testing::Test {
 protected:
+    const NoScreen m_noScreen;
     juce::ScopedJuceInitialiser_GUI m_juce;
     Notifier m_notifier;
     DataModel m_model;
@@ -80,6 +84,22 @@ TEST_F(MainGuiTest, ListensToOneNotifierAtATime)
     EXPECT_EQ(m_notifier.listeners, 0);
     EXPECT_EQ(other.listeners, 1);
     gui.setNotifier(nullptr);
+}
+
+TEST_F(MainGuiTest, SharesOneLookWithOtherWindowsWhichGoesWithTheLast)
+{
+    const auto isOurs = [] {
+        return dynamic_cast<LookAndFeel*>(&juce::LookAndFeel::getDefaultLookAndFeel()) != nullptr;
+    };
+    EXPECT_FALSE(isOurs());
+    std::optional<MainGui> first(std::in_place);
+    std::optional<MainGui> second(std::in_place);
+    EXPECT_EQ(&first->getLookAndFeel(), &second->getLookAndFeel());
+
+    first.reset();
+    EXPECT_TRUE(isOurs());
+    second.reset();
+    EXPECT_FALSE(isOurs());
 }
 
 TEST_F(MainGuiTest, ListensNoLongerWhenItHasGone)

@@ -17,62 +17,30 @@
 #include "velmark/Project.h"
 
 #include "tests/support/TempFolder.h"
+#include "tests/support/ThisProcess.h"
 #include "tests/support/TreePaths.h"
+#include "tests/support/host/AlteredContext.h"
+#include "tests/support/x11/HostLoop.h"
 #include "tests/support/x11/VirtualScreen.h"
 #include "tests/support/x11/XWindows.h"
 
 #include <gtest/gtest.h>
 
-#include <chrono>
 #include <filesystem>
-#include <fstream>
 #include <stdexcept>
 #include <string>
-#include <thread>
 #include <utility>
 #include <vector>
 
 using namespace Velmark;
 using cadrel::host::Cadrel;
+using cadrel::host::tests::AlteredContext;
+using cadrel::tests::isMapped;
+using cadrel::tests::ProcessResources;
 
 namespace {
 
 constexpr unsigned long Background = 0x2b2c2d;
-
-/// The stand-in's context with some of its services replaced; null takes one away.
-class OtherContext : public Implements<OtherContext, FObject, IHostContext> {
-public:
-    static constexpr const char* ClassName = "OtherContext";
-
-    explicit OtherContext(IHostContext* context) : m_context(context) {}
-
-    template <class Interface>
-    void replace(Interface* service)
-    {
-        m_replaced.push_back({Interface::iid, service});
-    }
-
-    int32 queryInterface(const Identifier& id, void** out) override
-    {
-        if (id == IHostContext::iid || id == FUnknown::iid)
-            return Implements::queryInterface(id, out);
-        return getInterface(id, out);
-    }
-    int32 getInterface(const Identifier& id, void** out) override
-    {
-        for (const auto& [replacedId, service] : m_replaced) {
-            if (replacedId != id)
-                continue;
-            *out = nullptr;
-            return service ? service->queryInterface(id, out) : ResultNoInterface;
-        }
-        return m_context->getInterface(id, out);
-    }
-
-private:
-    IHostContext* m_context;
-    std::vector<std::pair<Identifier, FUnknown*>> m_replaced;
-};
 
 class OtherHostInfo : public Implements<OtherHostInfo, FObject, IHostInfo> {
 public:
@@ -88,7 +56,7 @@ class Registries : public Implements<Registries, FObject, IMenuRegistry, IAction
 public:
     static constexpr const char* ClassName = "Registries";
 
-    enum class Step { Command, Handler, Factory };
+    enum class Step { Command, Handler, Factory, None };
 
     explicit Registries(Step refused) : m_refused(refused) {}
 
@@ -125,7 +93,12 @@ public:
     public:
         static constexpr const char* ClassName = "Window";
 
-        int32 open() override { return opens ? ResultOk : 7; }
+        int32 open() override
+        {
+            if (throwsAtOpen)
+                throw std::runtime_error("open");
+            return opens ? ResultOk : 7;
+        }
         int32 setCloseNotification(ICloseWindowNotification* given) override
         {
             listener = given;
@@ -134,6 +107,7 @@ public:
         int32 show(bool) override { throw std::runtime_error("window"); }
 
         bool opens = false;
+        bool throwsAtOpen = false;
         ICloseWindowNotification* listener = nullptr;
         Counted<IPlugView> view;
     };
@@ -143,6 +117,9 @@ public:
     {
         window = makeCounted<Window>();
         window->opens = opens;
+        window->throwsAtOpen = throwsAtOpen;
+        if (throws)
+            throw std::runtime_error("views");
         builder->createView(name, nullptr, window->view.out());
         if (failsAfterTheView)
             return ResultFalse;
@@ -152,10 +129,12 @@ public:
 
     Counted<Window> window;
     bool opens = false;
+    bool throws = false;
+    bool throwsAtOpen = false;
     bool failsAfterTheView = false;
 };
 
-class CadrelTest : public testing::Test {
+class CadrelTest : public testing::Test, protected cadrel::tests::HostLoop {
 protected:
     CadrelTest()
     {
@@ -167,6 +146,14 @@ protected:
         m_cadrel.reset();
         m_application.views().setWindowSystem(nullptr);
         ModuleState::get().exit();
+    }
+
+    /// A host that has a JUCE of its own serves it too.
+    void work() override
+    {
+        m_windows.serve();
+        m_application.idle();
+        cadrel::host::JuceLayer::serve();
     }
 
     /// In the context with what is replaced.
@@ -181,7 +168,7 @@ protected:
     cadrel::tests::VirtualScreen m_screen;
     cadrel::tests::XWindows m_windows;
     standin::Application m_application;
-    Counted<OtherContext> m_context = makeCounted<OtherContext>(m_application.context());
+    Counted<AlteredContext> m_context = makeCounted<AlteredContext>(m_application.context());
     Counted<Cadrel> m_cadrel = makeCounted<Cadrel>();
 };
 
@@ -204,7 +191,7 @@ TEST_F(CadrelTest, WorksInNoOtherHost)
 {
     EXPECT_EQ(m_cadrel->initialize(nullptr), 1);
     const auto info = makeCounted<OtherHostInfo>();
-    m_context->replace<IHostInfo>(info.get());
+    m_context->replace(IHostInfo::iid, info);
     for (const char* const name : {"Studio", "stagio", "Stagio 2", "", static_cast<const char*>(nullptr)}) {
         info->name = name;
         EXPECT_EQ(initialize(), 1);
@@ -218,7 +205,7 @@ TEST_F(CadrelTest, WorksInNoOtherHost)
 
 TEST_F(CadrelTest, WorksInNoHostWithoutAName)
 {
-    m_context->replace<IHostInfo>(nullptr);
+    m_context->hide(IHostInfo::iid);
 
     EXPECT_EQ(initialize(), 1);
     EXPECT_FALSE(isRegistered());
@@ -234,10 +221,10 @@ TEST_F(CadrelTest, TakesEachStepBackOnceWhenALaterOneFails)
     };
     for (const auto& [refused, removed] : expected) {
         const auto registries = makeCounted<Registries>(refused);
-        const auto context = makeCounted<OtherContext>(m_application.context());
-        context->replace<IMenuRegistry>(registries.get());
-        context->replace<IActionManager>(registries.get());
-        context->replace<IWindowFactoryRegistry>(registries.get());
+        const auto context = makeCounted<AlteredContext>(m_application.context());
+        context->replace(IMenuRegistry::iid, registries);
+        context->replace(IActionManager::iid, registries);
+        context->replace(IWindowFactoryRegistry::iid, registries);
 
         EXPECT_NE(m_cadrel->initialize(static_cast<IHostContext*>(context.get())), ResultOk);
         EXPECT_EQ(registries->removed, removed);
@@ -254,7 +241,7 @@ TEST_F(CadrelTest, WritesNothingIntoProjectsOfAHostThatItDoesNotWorkIn)
     auto& project = m_application.createProject();
     m_application.activateProject(&project);
     const auto registries = makeCounted<Registries>(Registries::Step::Factory);
-    m_context->replace<IWindowFactoryRegistry>(registries.get());
+    m_context->replace(IWindowFactoryRegistry::iid, registries);
     ASSERT_NE(initialize(), ResultOk);
 
     m_application.saveProject(project, folder.path() / "Film.stagio");
@@ -272,7 +259,7 @@ TEST_F(CadrelTest, KeepsWhatItHasOfProjectsWhenALaterInitialisationFails)
     m_cadrel->initialize(m_application.context());
     m_cadrel->terminate();
     const auto registries = makeCounted<Registries>(Registries::Step::Factory);
-    m_context->replace<IWindowFactoryRegistry>(registries.get());
+    m_context->replace(IWindowFactoryRegistry::iid, registries);
     ASSERT_NE(initialize(), ResultOk);
 
     m_application.saveProject(project, folder.path() / "Film.stagio");
@@ -281,7 +268,7 @@ TEST_F(CadrelTest, KeepsWhatItHasOfProjectsWhenALaterInitialisationFails)
 
 TEST_F(CadrelTest, NeedsTheProjectsOfTheHost)
 {
-    m_context->replace<IProjectManager>(nullptr);
+    m_context->hide(IProjectManager::iid);
 
     EXPECT_NE(initialize(), ResultOk);
     EXPECT_FALSE(isRegistered());
@@ -289,11 +276,11 @@ TEST_F(CadrelTest, NeedsTheProjectsOfTheHost)
 
 TEST_F(CadrelTest, DoesWithoutMenusActionsWindowsAndTranslations)
 {
-    m_context->replace<IMenuRegistry>(nullptr);
-    m_context->replace<IActionManager>(nullptr);
-    m_context->replace<IWindowFactoryRegistry>(nullptr);
-    m_context->replace<ITranslationService>(nullptr);
-    m_context->replace<IViewManager>(nullptr);
+    m_context->hide(IMenuRegistry::iid);
+    m_context->hide(IActionManager::iid);
+    m_context->hide(IWindowFactoryRegistry::iid);
+    m_context->hide(ITranslationService::iid);
+    m_context->hide(IViewManager::iid);
 
     EXPECT_EQ(initialize(), ResultOk);
     EXPECT_FALSE(isRegistered());
@@ -359,7 +346,7 @@ TEST_F(CadrelTest, ShowsTheModelOfTheProjectThatIsActiveFromTheStart)
 TEST_F(CadrelTest, ForgetsAWindowThatDoesNotOpen)
 {
     const auto views = makeCounted<BrokenViews>();
-    m_context->replace<IViewManager>(views.get());
+    m_context->replace(IViewManager::iid, views);
     initialize();
 
     EXPECT_EQ(m_cadrel->handleAction("Cadrel", "ShowDialog", true), 7);
@@ -373,7 +360,7 @@ TEST_F(CadrelTest, EndsAViewThatTheHostHasFoundNoWindowFor)
 {
     const auto views = makeCounted<BrokenViews>();
     views->failsAfterTheView = true;
-    m_context->replace<IViewManager>(views.get());
+    m_context->replace(IViewManager::iid, views);
     initialize();
     ASSERT_NE(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
     ASSERT_TRUE(views->window->view);
@@ -387,7 +374,7 @@ TEST_F(CadrelTest, EndsItsViewAlsoWhereAWindowOfTheHostThrows)
 {
     const auto views = makeCounted<BrokenViews>();
     views->opens = true;
-    m_context->replace<IViewManager>(views.get());
+    m_context->replace(IViewManager::iid, views);
     initialize();
     ASSERT_EQ(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
     auto* const view = dynamic_cast<juce::Component*>(views->window->view.get());
@@ -398,6 +385,53 @@ TEST_F(CadrelTest, EndsItsViewAlsoWhereAWindowOfTheHostThrows)
     EXPECT_EQ(view->getNumChildComponents(), 0);
     EXPECT_FALSE(m_cadrel->hasWindow(views->window.get()));
     EXPECT_FALSE(isRegistered());
+}
+
+TEST_F(CadrelTest, LetsNoExceptionOfTheWindowsOfAHostOut)
+{
+    const auto views = makeCounted<BrokenViews>();
+    m_context->replace(IViewManager::iid, views);
+    initialize();
+    const auto show = [this] { return m_cadrel->handleAction("Cadrel", "ShowDialog", true); };
+
+    views->throws = true;
+    EXPECT_NE(show(), ResultOk);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
+    views->throws = false;
+    views->throwsAtOpen = true;
+    EXPECT_NE(show(), ResultOk);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
+    EXPECT_EQ(views->window->listener, nullptr);
+
+    views->throwsAtOpen = false;
+    views->opens = true;
+    EXPECT_EQ(show(), ResultOk);
+    EXPECT_NE(show(), ResultOk) << "It is there, and throws when it is shown.";
+    EXPECT_TRUE(m_cadrel->hasWindow(views->window.get()));
+}
+
+TEST_F(CadrelTest, TakesItsRegistrationsBackOnceTheLastOneFirst)
+{
+    const auto registries = makeCounted<Registries>(Registries::Step::None);
+    m_context->replace(IMenuRegistry::iid, registries);
+    m_context->replace(IActionManager::iid, registries);
+    m_context->replace(IWindowFactoryRegistry::iid, registries);
+    ASSERT_EQ(initialize(), ResultOk);
+
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+    EXPECT_EQ(registries->removed, (std::vector<std::string>{"factory", "handler", "command"}));
+    EXPECT_EQ(m_cadrel->terminate(), ResultOk);
+    m_cadrel.reset();
+    EXPECT_EQ(registries->removed.size(), 3U);
+}
+
+TEST_F(CadrelTest, MakesNoViewBeforeItIsInitialised)
+{
+    Counted<IPlugView> view;
+    EXPECT_EQ(m_cadrel->createView("CadrelWindow", nullptr, view.out()), 4);
+    EXPECT_FALSE(view);
+    EXPECT_NE(m_cadrel->handleAction("Cadrel", "ShowDialog", true), ResultOk);
+    EXPECT_EQ(m_cadrel->getWindow(), nullptr);
 }
 
 TEST_F(CadrelTest, TitlesItsCommandInTheLanguageThatTheHostKnowsBefore)
@@ -413,42 +447,19 @@ TEST_F(CadrelTest, IsUnmappedAsAModuleOfAHostWithAJuceOfItsOwn)
 {
     const cadrel::host::JuceLayer ofTheHost;
     const auto module = std::filesystem::path(cadrel::tests::programPath("../lib/Cadrel.so")).lexically_normal();
-    const auto isMapped = [] {
-        std::ifstream maps("/proc/self/maps");
-        for (std::string line; std::getline(maps, line);) {
-            if (line.ends_with("/Cadrel.so"))
-                return true;
-        }
-        return false;
-    };
-    const auto countOf = [](const char* folder) {
-        return std::distance(std::filesystem::directory_iterator(folder), std::filesystem::directory_iterator());
-    };
-    const auto isDrawnInTime = [this] {
-        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-        while (m_windows.colourAt(400, 400) != Background && std::chrono::steady_clock::now() < end) {
-            m_windows.serve();
-            m_application.idle();
-            cadrel::host::JuceLayer::serve();
-            std::this_thread::sleep_for(std::chrono::milliseconds(5));
-        }
-        return m_windows.colourAt(400, 400) == Background;
-    };
     const auto loadAndUnload = [&] {
         const standin::ModuleLoader loader(m_application, module, m_bundle);
-        ASSERT_TRUE(isMapped());
+        ASSERT_TRUE(isMapped("Cadrel.so"));
         ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
-        ASSERT_TRUE(isDrawnInTime());
+        ASSERT_TRUE(turnUntil([this] { return m_windows.colourAt(400, 400) == Background; }));
     };
     // What the first round opens for good, fonts for one, is the system's.
     loadAndUnload();
-    ASSERT_FALSE(isMapped());
-    const auto threads = countOf("/proc/self/task");
-    const auto descriptors = countOf("/proc/self/fd");
+    ASSERT_FALSE(isMapped("Cadrel.so"));
+    const ProcessResources before;
     for (int round = 0; round < 20; ++round) {
         loadAndUnload();
-        ASSERT_FALSE(isMapped()) << round;
-        EXPECT_EQ(countOf("/proc/self/task"), threads) << round;
-        EXPECT_EQ(countOf("/proc/self/fd"), descriptors) << round;
+        ASSERT_FALSE(isMapped("Cadrel.so")) << round;
+        EXPECT_EQ(ProcessResources(), before) << round;
     }
 }

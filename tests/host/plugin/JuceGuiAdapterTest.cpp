@@ -7,22 +7,24 @@
 #include "standin/window/HostWindow.h"
 #include "velmark/Context.h"
 
+#include "tests/support/x11/HostLoop.h"
 #include "tests/support/x11/VirtualScreen.h"
 #include "tests/support/x11/XUser.h"
 #include "tests/support/x11/XWindows.h"
 
 #include <gtest/gtest.h>
 
+#include <X11/XF86keysym.h>
 #include <X11/keysym.h>
 
 #include <algorithm>
-#include <chrono>
-#include <functional>
+#include <clocale>
+#include <cstdlib>
 #include <memory>
 #include <optional>
 #include <stdexcept>
 #include <string>
-#include <thread>
+#include <utility>
 #include <vector>
 
 using namespace Velmark;
@@ -78,12 +80,13 @@ public:
     bool keyPressed(const juce::KeyPress& key) override
     {
         m_calls.push_back("key " + key.getTextDescription().toStdString());
-        return key.getKeyCode() == 'a';
+        return usesAllKeys || key.getKeyCode() == 'a';
     }
 
     juce::TextEditor field;
     juce::TextEditor second;
     juce::Point<int> place;
+    bool usesAllKeys = false;
     bool throws = false;
     bool throwsAtFocusLost = false;
     bool throwsWhenAttached = false;
@@ -109,7 +112,7 @@ public:
     std::vector<std::string> invoked;
 };
 
-class JuceGuiAdapterTest : public testing::Test {
+class JuceGuiAdapterTest : public testing::Test, protected cadrel::tests::HostLoop {
 protected:
     ~JuceGuiAdapterTest() override
     {
@@ -160,21 +163,10 @@ protected:
         open();
     }
 
-    void turn()
+    void work() override
     {
         m_windows->serve();
         m_view->idle();
-        std::this_thread::sleep_for(std::chrono::milliseconds(10));
-    }
-    bool turnUntil(const std::function<bool()>& condition)
-    {
-        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-        while (!condition()) {
-            if (std::chrono::steady_clock::now() > end)
-                return false;
-            turn();
-        }
-        return true;
     }
     bool has(const std::string& call) const { return std::find(m_calls.begin(), m_calls.end(), call) != m_calls.end(); }
     /// In the empty part of the content.
@@ -306,12 +298,165 @@ TEST_F(JuceGuiAdapterTest, SendsAKeyOnAsTheUserHasPressedIt)
     m_user->press(XK_KP_Enter);
     m_user->press('b', XK_Control_L);
     EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() >= 12; }));
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_EQ(m_windows->keyEvents(),
               (std::vector<std::string>{"press KP_Add", "release KP_Add", "press plus", "release plus",
                                         "press KP_Subtract", "release KP_Subtract", "press KP_Home", "release KP_Home",
                                         "press KP_Enter", "release KP_Enter", "press b", "release b"}));
+}
+
+namespace {
+
+constexpr unsigned long CyrillicZheByNumber = 0x01000416;
+
+/// With the locale of the user, which a program takes over that asks for it, and the one of the host itself.
+class JuceGuiAdapterLocale : public JuceGuiAdapterTest,
+                             public testing::WithParamInterface<std::pair<const char*, const char*>> {
+protected:
+    JuceGuiAdapterLocale() : m_users(std::getenv("LC_ALL") ? std::getenv("LC_ALL") : "")
+    {
+        setenv("LC_ALL", GetParam().first, 1);
+        std::setlocale(LC_ALL, GetParam().second);
+    }
+    ~JuceGuiAdapterLocale() override
+    {
+        std::setlocale(LC_ALL, "C");
+        if (m_users.empty())
+            unsetenv("LC_ALL");
+        else
+            setenv("LC_ALL", m_users.c_str(), 1);
+    }
+
+    /// Beyond ASCII, with the keysyms of Latin-1, of other sets of characters and by their number in Unicode; and an accent.
+    const std::vector<unsigned long> m_letters = {XK_adiaeresis, XK_EuroSign, XK_Cyrillic_ef, CyrillicZheByNumber,
+                                                  XK_dead_acute};
+
+private:
+    std::string m_users;
+};
+
+} // namespace
+
+INSTANTIATE_TEST_SUITE_P(OfUserAndHost, JuceGuiAdapterLocale,
+                         testing::Values(std::pair("C.UTF-8", "C"), std::pair("C.UTF-8", "C.UTF-8"),
+                                         std::pair("C", "C"), std::pair("C", "C.UTF-8")));
+
+TEST_P(JuceGuiAdapterLocale, LeavesTheLettersOfAllLanguagesToTheHost)
+{
+    startServer();
+    for (const unsigned long letter : m_letters)
+        m_user->addKey(letter);
+    makeView();
+    open();
+    clickContent();
+
+    for (const unsigned long letter : m_letters) {
+        m_user->press(letter);
+        m_user->press('a');
+    }
+    EXPECT_TRUE(turnUntil([this] { return m_windows->keys().size() >= m_letters.size(); }));
+    turn(5);
+    EXPECT_EQ(m_windows->keys(), m_letters);
+    EXPECT_EQ(m_windows->keyEvents().size(), 2 * m_letters.size());
+    EXPECT_STREQ(std::setlocale(LC_ALL, nullptr), GetParam().second);
+}
+
+/// JUCE knows no letters but those of ASCII where the user's locale has no others.
+class JuceGuiAdapterText : public JuceGuiAdapterLocale {};
+
+INSTANTIATE_TEST_SUITE_P(OfUserAndHost, JuceGuiAdapterText,
+                         testing::Values(std::pair("C.UTF-8", "C"), std::pair("C.UTF-8", "C.UTF-8")));
+
+TEST_P(JuceGuiAdapterText, KeepsTheLettersThatATextFieldUses)
+{
+    startServer();
+    m_user->addKey(XK_adiaeresis);
+    makeView();
+    open();
+    m_user->moveTo(100, 52);
+    m_user->click();
+    ASSERT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
+
+    m_user->press(XK_adiaeresis);
+    m_user->press('b');
+    EXPECT_TRUE(turnUntil([this] { return m_content->field.getText() == juce::String::fromUTF8("äb"); }));
+    turn(5);
+    EXPECT_EQ(m_windows->keys(), std::vector<unsigned long>());
+}
+
+TEST_F(JuceGuiAdapterTest, LeavesTheKeysToTheHostThatNoComponentCanHave)
+{
+    constexpr unsigned long EndsAsLeft = 0x1008ff51;
+    const std::vector<unsigned long> keys = {XK_Pause,         XK_F5,      XK_Print, XK_space, XK_Menu,
+                                             XF86XK_AudioPlay, EndsAsLeft, XK_Left};
+    startServer();
+    m_user->addKey(XF86XK_AudioPlay);
+    m_user->addKey(EndsAsLeft);
+    makeView();
+    open();
+    clickContent();
+
+    for (const unsigned long key : keys) {
+        m_user->press(key);
+        m_user->press('a');
+    }
+    EXPECT_TRUE(turnUntil([&] { return m_windows->keys().size() >= keys.size(); }));
+    turn(5);
+    EXPECT_EQ(m_windows->keys(), keys);
+    EXPECT_EQ(m_windows->keyEvents().size(), 2 * keys.size());
+}
+
+TEST_F(JuceGuiAdapterTest, KeepsTheKeysWithoutACharacterThatAComponentUses)
+{
+    const std::vector<unsigned long> keys = {XK_F1,     XK_F12,    XK_F35,     XK_Left,      XK_Home,     XK_End,
+                                             XK_Insert, XK_Delete, XK_KP_Home, XK_KP_Insert, XK_KP_Delete};
+    startServer();
+    m_user->addKey(XK_F35);
+    makeView();
+    open();
+    clickContent();
+    m_content->usesAllKeys = true;
+
+    for (const unsigned long key : keys)
+        m_user->press(key);
+    m_user->press(XK_space, XK_Control_L);
+    EXPECT_TRUE(turnUntil([&] { return m_calls.size() > keys.size(); }));
+    turn(5);
+    EXPECT_EQ(m_calls.size(), keys.size() + 1);
+    EXPECT_EQ(m_windows->keyEvents(), std::vector<std::string>());
+}
+
+TEST_F(JuceGuiAdapterTest, SendsNoKeyOnThatOnlyChangesOthers)
+{
+    const std::vector<unsigned long> keys = {XK_Shift_L,          XK_Control_R, XK_Alt_L,    XK_Super_L,
+                                             XK_Caps_Lock,        XK_Caps_Lock, XK_Num_Lock, XK_Num_Lock,
+                                             XK_ISO_Level3_Shift, XK_Multi_key};
+    startServer();
+    m_user->addKey(XK_Multi_key);
+    makeView();
+    open();
+    clickContent();
+
+    for (const unsigned long key : keys)
+        m_user->press(key);
+    m_user->press('b');
+    EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() >= 2; }));
+    turn(5);
+    EXPECT_EQ(m_windows->keyEvents(), (std::vector<std::string>{"press b", "release b"}));
+}
+
+TEST_F(JuceGuiAdapterTest, LeavesTheKeysToTheHostThatControlTakesTheCharacterFrom)
+{
+    start();
+    clickContent();
+
+    m_user->press(XK_space, XK_Control_L);
+    m_user->press('2', XK_Control_L);
+    m_user->press('2', XK_Control_L, XK_Shift_L);
+    EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() >= 6; }));
+    turn(5);
+    EXPECT_EQ(m_windows->keyEvents(), (std::vector<std::string>{"press space", "release space", "press 2", "release 2",
+                                                                "press at", "release at"}));
 }
 
 TEST_F(JuceGuiAdapterTest, SendsTheReleaseOfAKeyOnWhenItComes)
@@ -321,8 +466,7 @@ TEST_F(JuceGuiAdapterTest, SendsTheReleaseOfAKeyOnWhenItComes)
 
     m_user->hold(XK_F5);
     EXPECT_TRUE(turnUntil([this] { return !m_windows->keyEvents().empty(); }));
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_EQ(m_windows->keyEvents(), std::vector<std::string>{"press F5"});
     m_user->release(XK_F5);
     EXPECT_TRUE(turnUntil([this] { return m_windows->keyEvents().size() > 1; }));
@@ -340,8 +484,7 @@ TEST_F(JuceGuiAdapterTest, KeepsTabWhichMovesTheKeyboardFromFieldToField)
     EXPECT_TRUE(turnUntil([this] { return m_content->second.hasKeyboardFocus(true); }));
     m_user->press(XK_Tab, XK_Shift_L);
     EXPECT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_EQ(m_windows->keyEvents(), std::vector<std::string>());
 }
 
@@ -388,8 +531,7 @@ TEST_F(JuceGuiAdapterTest, AnswersWhetherItHasUsedAKeyOfTheHost)
     EXPECT_TRUE(has("key shift + alt + F12"));
     EXPECT_EQ(m_view->onKeyDown(0, 0, 0), 0);
     EXPECT_EQ(m_view->onKeyUp(u'a', 0, 0), 0);
-    for (int count = 0; count < 5; ++count)
-        turn();
+    turn(5);
     EXPECT_TRUE(m_windows->keys().empty());
 }
 

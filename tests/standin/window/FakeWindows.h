@@ -66,55 +66,59 @@ public:
     Velmark::int32 attached(void* parent, const char* type) override
     {
         m_calls.push_back(std::string("attached to ") + type);
+        duringCall("attached");
         return refusesParent ? Velmark::ResultFalse : CPluginView::attached(parent, type);
     }
     Velmark::int32 removed() override
     {
         m_calls.push_back("removed");
+        duringCall("removed");
         return CPluginView::removed();
     }
     Velmark::int32 idle() override
     {
         m_calls.push_back("idle");
+        duringCall("idle");
         return Velmark::ResultOk;
     }
     Velmark::int32 onSize(const Velmark::ViewRect& rect) override
     {
         m_calls.push_back("on size " + std::to_string(rect.right) + " x " + std::to_string(rect.bottom));
         const Velmark::int32 result = CPluginView::onSize(rect);
-        duringCall();
+        duringCall("onSize");
         return result;
     }
     Velmark::int32 onFocus(bool state) override
     {
         m_calls.push_back(state ? "focus" : "no focus");
-        duringCall();
+        duringCall("onFocus");
         return Velmark::ResultOk;
     }
     Velmark::int32 setFrame(Velmark::IPlugFrame* given) override
     {
         m_calls.push_back(given ? "frame" : "no frame");
         frame = given;
-        return CPluginView::setFrame(given);
+        const Velmark::int32 result = CPluginView::setFrame(given);
+        duringCall("setFrame");
+        return result;
     }
     Velmark::int32 checkSizeConstraint(Velmark::ViewRect& rect) override
     {
         rect.right = rect.right < 500 ? 500 : rect.right;
-        if (closesWhenConstrained)
-            duringCall();
+        duringCall("checkSizeConstraint");
         return Velmark::ResultOk;
     }
 
     Velmark::IPlugFrame* frame = nullptr;
     bool refusesParent = false;
-    /// What the view does in onSize and onFocus, and in checkSizeConstraint if told so.
+    /// What the view does in the next call of that name.
     std::function<void()> action;
-    bool closesWhenConstrained = false;
+    std::string actsIn;
 
 private:
-    void duringCall()
+    void duringCall(const char* name)
     {
-        if (!action)
+        if (!action || actsIn != name)
             return;
         const auto once = std::exchange(action, nullptr);
         once();

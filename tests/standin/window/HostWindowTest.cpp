@@ -167,10 +167,11 @@ TEST_F(HostWindowTest, HoldsTheUserToSizesThatTheViewCanHave)
 TEST_F(HostWindowTest, KeepsAViewUntilItsCallIsOverThatClosesTheWindow)
 {
     const Calls closing = {"removed", "no frame", "window closed", "closed", "done", "view gone"};
-    const auto callsOf = [&](const std::function<void(standin::NativeWindow::Listener&)>& event) {
+    const auto callsOf = [&](const char* call, const std::function<void(standin::NativeWindow::Listener&)>& event) {
         make();
         m_window->open();
         taken();
+        m_view->actsIn = call;
         m_view->action = [this] { m_window->show(false); };
         event(m_windows.last->listener);
         return taken();
@@ -180,13 +181,42 @@ TEST_F(HostWindowTest, KeepsAViewUntilItsCallIsOverThatClosesTheWindow)
         calls.insert(calls.end(), closing.begin(), closing.end());
         return calls;
     };
-    EXPECT_EQ(callsOf([](auto& listener) { listener.focusChanged(true); }), after("focus"));
-    EXPECT_EQ(callsOf([](auto& listener) { listener.resizedByUser(800, 300); }), after("on size 800 x 300"));
-    EXPECT_EQ(callsOf([this](auto& listener) {
-                  m_view->closesWhenConstrained = true;
-                  listener.resizedByUser(499, 300);
-              }),
-              closing);
+    EXPECT_EQ(callsOf("onFocus", [](auto& listener) { listener.focusChanged(true); }), after("focus"));
+    EXPECT_EQ(callsOf("onSize", [](auto& listener) { listener.resizedByUser(800, 300); }), after("on size 800 x 300"));
+    EXPECT_EQ(callsOf("checkSizeConstraint", [](auto& listener) { listener.resizedByUser(499, 300); }), closing);
+    EXPECT_EQ(callsOf("idle", [this](auto&) { m_window->idle(); }), after("idle"));
+}
+
+TEST_F(HostWindowTest, ClosesOnceWhereTheViewClosesItAgain)
+{
+    make();
+    m_window->open();
+    taken();
+    m_view->actsIn = "removed";
+    m_view->action = [this] { EXPECT_NE(m_window->show(false), ResultOk); };
+
+    EXPECT_EQ(m_window->show(false), ResultOk);
+    EXPECT_EQ(taken(), (Calls{"removed", "done", "no frame", "view gone", "window closed", "closed"}));
+}
+
+TEST_F(HostWindowTest, DoesNotOpenWhereTheViewClosesItMeanwhile)
+{
+    const Calls closing = {"removed", "no frame", "window closed", "closed", "done", "view gone"};
+    const auto callsOf = [&](const char* call) {
+        make();
+        m_view->actsIn = call;
+        m_view->action = [this] { m_window->show(false); };
+        EXPECT_NE(m_window->open(), ResultOk);
+        EXPECT_EQ(m_window->native(), nullptr);
+        EXPECT_NE(m_window->show(true), ResultOk);
+        return taken();
+    };
+    const auto after = [&](Calls calls) {
+        calls.insert(calls.end(), closing.begin(), closing.end());
+        return calls;
+    };
+    EXPECT_EQ(callsOf("setFrame"), after({"window Title 600 x 400", "frame"}));
+    EXPECT_EQ(callsOf("attached"), after({"window Title 600 x 400", "frame", "attached to Fake"}));
 }
 
 TEST_F(HostWindowTest, TellsTheViewOfTheKeyboard)

@@ -8,7 +8,10 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <functional>
 #include <string>
+#include <utility>
+#include <vector>
 
 using namespace Velmark;
 using cadrel::tests::FakeView;
@@ -28,11 +31,13 @@ public:
         m_calls.push_back(std::string("view for ") + name);
         if (isOutOfViews)
             return ResultFalse;
-        *view = makeCounted<FakeView>(m_calls).detach();
+        last = makeCounted<FakeView>(m_calls).detach();
+        *view = last;
         return ResultOk;
     }
 
     bool isOutOfViews = false;
+    FakeView* last = nullptr;
 
 private:
     std::vector<std::string>& m_calls;
@@ -125,6 +130,29 @@ TEST_F(ViewManagerTest, KeepsAWindowWhileItIsOpen)
     m_windows.last->listener.closedByUser();
     EXPECT_TRUE(has("view gone"));
     EXPECT_TRUE(m_views->windows().empty());
+}
+
+TEST_F(ViewManagerTest, KeepsAWindowUntilTheCallIsOverInWhichItsViewClosesIt)
+{
+    m_views->setWindowSystem(&m_windows);
+    loadSkin();
+    const std::vector<std::pair<const char*, std::function<void()>>> events = {
+        {"onFocus", [this] { m_windows.last->listener.focusChanged(true); }},
+        {"onSize", [this] { m_windows.last->listener.resizedByUser(800, 300); }},
+        {"checkSizeConstraint", [this] { m_windows.last->listener.resizedByUser(499, 300); }},
+        {"idle", [this] { m_views->idle(); }},
+        {"removed", [this] { m_windows.last->listener.closedByUser(); }},
+    };
+    for (const auto& [call, happen] : events) {
+        ASSERT_EQ(open("Main"), ResultOk) << call;
+        m_window.reset();
+        m_builder->last->actsIn = call;
+        m_builder->last->action = [this] { m_views->closeAll(); };
+        happen();
+        EXPECT_TRUE(m_views->windows().empty()) << call;
+        EXPECT_EQ(std::count(m_windows.calls.begin(), m_windows.calls.end(), "view gone"), 1) << call;
+        m_windows.calls.clear();
+    }
 }
 
 TEST_F(ViewManagerTest, ClosesAllWindowsBeforeTheirSystemGoes)

@@ -9,6 +9,8 @@
 
 #include <fstream>
 
+#include <sys/stat.h>
+
 using standin::readWindowDescriptions;
 using standin::WindowDescription;
 
@@ -53,18 +55,42 @@ TEST(WindowDescription, MayBeOfNoWindows)
     EXPECT_TRUE(windows->empty());
 }
 
-TEST(WindowDescription, IsRefusedAsAWholeWhenItIsBroken)
+TEST(WindowDescription, IsRefusedWhereItIsNoXml)
 {
     EXPECT_FALSE(read(""));
+    EXPECT_FALSE(read("windows"));
     EXPECT_FALSE(read("<windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\"></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\" name=\"b\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\"/></windows"));
+}
+
+TEST(WindowDescription, IsRefusedWhereItsTextsAreNotUtf8)
+{
+    EXPECT_FALSE(read("<windows><window name=\"\xff\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\" title=\"Gr\xf6\xdf\x65\"/></windows>"));
+    EXPECT_FALSE(read(std::string("<\0w\0i\0n\0d\0o\0w\0s\0/\0>\0", 20)));
+}
+
+TEST(WindowDescription, IsRefusedWithAnythingBesideTheWindows)
+{
     EXPECT_FALSE(read("<other/>"));
     EXPECT_FALSE(read("<windows/><windows/>"));
+    EXPECT_FALSE(read("<windows/><other/>"));
+    EXPECT_FALSE(read("<other/><windows/>"));
+    EXPECT_FALSE(read("text<windows/>"));
+    EXPECT_FALSE(read("<windows/>text"));
+    EXPECT_FALSE(read("<windows>text</windows>"));
+    EXPECT_FALSE(read("<windows><![CDATA[text]]></windows>"));
+    EXPECT_FALSE(read("<windows version=\"2\"/>"));
     EXPECT_FALSE(read("<windows><other name=\"a\"/></windows>"));
-    EXPECT_FALSE(read("<windows><window title=\"a\"/></windows>"));
-    EXPECT_FALSE(read("<windows><window name=\"\"/></windows>"));
-    EXPECT_FALSE(read("<windows><window name=\"a\"/><window name=\"a\"/></windows>"));
-    EXPECT_FALSE(read("<windows><window name=\"a\" resizable=\"yes\"/></windows>"));
-    EXPECT_FALSE(read("<windows><window name=\"\xff\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\"/><other/></windows>"));
+    EXPECT_TRUE(read("<!-- Before. --><windows><!-- Within. --></windows><!-- After. -->"));
+}
+
+TEST(WindowDescription, IsRefusedWithAnythingWithinAWindow)
+{
     EXPECT_FALSE(read("<windows><window name=\"a\">text</window></windows>"));
     EXPECT_FALSE(read("<windows><window name=\"a\"><window name=\"b\"/></window></windows>"));
     EXPECT_FALSE(read("<windows><window name=\"a\"><![CDATA[text]]></window></windows>"));
@@ -72,12 +98,34 @@ TEST(WindowDescription, IsRefusedAsAWholeWhenItIsBroken)
     EXPECT_TRUE(read("<windows><window name=\"a\"> <!-- Remark. --> </window></windows>"));
 }
 
-TEST(WindowDescription, IsNotReadFromAFolderOrFromNothing)
+TEST(WindowDescription, IsRefusedWithAWindowThatHasNoNameOfItsOwn)
+{
+    EXPECT_FALSE(read("<windows><window/></windows>"));
+    EXPECT_FALSE(read("<windows><window title=\"a\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\"/><window name=\"a\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\"/><window name=\"b\"/><window name=\"a\"/></windows>"));
+    EXPECT_TRUE(read("<windows><window name=\"a\"/><window name=\"A\"/></windows>"));
+}
+
+TEST(WindowDescription, IsRefusedWithOtherAttributesOrValues)
+{
+    EXPECT_FALSE(read("<windows><window name=\"a\" width=\"100\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\" resizable=\"yes\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\" resizable=\"\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\" resizable=\"True\"/></windows>"));
+    EXPECT_FALSE(read("<windows><window name=\"a\" resizable=\"1\"/></windows>"));
+}
+
+TEST(WindowDescription, IsReadFromAFileAlone)
 {
     const cadrel::tests::TempFolder folder;
 
     EXPECT_FALSE(readWindowDescriptions(folder.path()));
     EXPECT_FALSE(readWindowDescriptions(folder.path() / "missing.xml"));
+    // Nobody writes into the pipe, so that whoever opened it would wait for ever.
+    ASSERT_EQ(mkfifo((folder.path() / "pipe.xml").c_str(), 0600), 0);
+    EXPECT_FALSE(readWindowDescriptions(folder.path() / "pipe.xml"));
 }
 
 TEST(WindowDescription, OfTheModuleDescribesItsWindow)

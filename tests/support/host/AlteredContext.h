@@ -30,6 +30,11 @@ public:
         m_altered.push_back({id, std::move(object)});
     }
 
+    /// Its services are found in this way too, as with any host.
+    Velmark::int32 queryInterface(const Velmark::Identifier& id, void** out) override
+    {
+        return Implements::queryInterface(id, out) == Velmark::ResultOk ? Velmark::ResultOk : getInterface(id, out);
+    }
     Velmark::int32 getInterface(const Velmark::Identifier& id, void** out) override
     {
         for (const auto& [altered, object] : m_altered) {

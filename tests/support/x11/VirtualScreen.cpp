@@ -38,6 +38,11 @@ std::string readLine(int descriptor)
 
 } // namespace
 
+NoScreen::NoScreen()
+{
+    hideOtherScreens();
+}
+
 VirtualScreen::VirtualScreen(int width, int height)
 {
     int ends[2];
@@ -68,6 +73,16 @@ VirtualScreen::~VirtualScreen()
     hideOtherScreens();
     kill(m_server, SIGTERM);
     waitpid(m_server, nullptr, 0);
+}
+
+void VirtualScreen::introduceNames()
+{
+    Display* const display = XOpenDisplay(nullptr);
+    for (const char* const name :
+         {"WM_PROTOCOLS", "WM_TAKE_FOCUS", "WM_DELETE_WINDOW", "_NET_WM_PING", "WM_CHANGE_STATE", "WM_STATE",
+          "_NET_WM_WINDOW_TYPE", "_NET_WM_STATE", "_NET_WM_STATE_HIDDEN", "_NET_WM_NAME", "_MOTIF_WM_HINTS"})
+        XInternAtom(display, name, False);
+    XCloseDisplay(display);
 }
 
 void VirtualScreen::setDpi(const std::string& dpi)

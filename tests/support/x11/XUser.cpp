@@ -2,6 +2,7 @@
 
 #include "tests/support/x11/XUser.h"
 
+#include <X11/XKBlib.h>
 #include <X11/Xlib.h>
 #include <X11/extensions/XTest.h>
 
@@ -18,6 +19,29 @@ XUser::XUser() : m_display(XOpenDisplay(nullptr))
 XUser::~XUser()
 {
     XCloseDisplay(m_display);
+}
+
+void XUser::addKey(unsigned long key)
+{
+    int first = 0;
+    int last = 0;
+    XDisplayKeycodes(m_display, &first, &last);
+    for (int keycode = last; keycode >= first; --keycode) {
+        if (XkbKeycodeToKeysym(m_display, static_cast<KeyCode>(keycode), 0, 0) != NoSymbol)
+            continue;
+        KeySym symbols[] = {key};
+        XChangeKeyboardMapping(m_display, keycode, 1, symbols, 1);
+        XSync(m_display, False);
+        // What has come of it is read with the next event, and Xlib then forgets the keys of before.
+        while (XPending(m_display) > 0) {
+            XEvent event;
+            XNextEvent(m_display, &event);
+            if (event.type == MappingNotify)
+                XRefreshKeyboardMapping(&event.xmapping);
+        }
+        return;
+    }
+    throw std::runtime_error("no key is free");
 }
 
 void XUser::moveTo(int x, int y)

@@ -14,6 +14,9 @@ public:
     XUser& operator=(const XUser&) = delete;
     ~XUser();
 
+    /// Puts a keysym on a key that has had none, for as long as the server runs.
+    void addKey(unsigned long key);
+
     void moveTo(int x, int y);
     /// Where the mouse is.
     void click();

@@ -1,0 +1,48 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "gui/input/NumberEntry.h"
+
+#include <array>
+#include <charconv>
+#include <cmath>
+
+namespace cadrel::gui {
+
+void NumberEntry::set(double value)
+{
+    m_value = std::isnan(value) ? m_minimum : value;
+    if (m_value > m_maximum)
+        m_value = m_maximum;
+    if (m_value < m_minimum)
+        m_value = m_minimum;
+}
+
+void NumberEntry::setRange(double minimum, double maximum, double step)
+{
+    m_minimum = minimum;
+    m_maximum = maximum;
+    m_step = step;
+    set(m_value);
+}
+
+void NumberEntry::type(const std::string& text)
+{
+    double number = 0.0;
+    const char* const end = text.data() + text.size();
+    const auto [stop, failure] = std::from_chars(text.data(), end, number);
+    if (failure == std::errc::result_out_of_range)
+        set(m_maximum);
+    else
+        set(failure == std::errc() && stop == end && std::isfinite(number) ? number : 0.0);
+}
+
+std::string NumberEntry::number() const
+{
+    // Long enough for the longest number without an exponent.
+    std::array<char, 400> digits{};
+    const auto [end, failure] =
+        std::to_chars(digits.data(), digits.data() + digits.size(), m_value, std::chars_format::fixed);
+    return failure == std::errc() ? std::string(digits.data(), end) : std::string();
+}
+
+} // namespace cadrel::gui

@@ -1,0 +1,45 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "gui/look/ButtonTile.h"
+
+#include "gui/look/Text.h"
+
+namespace cadrel::gui {
+
+namespace {
+
+constexpr float OuterCorner = 2.0F;
+constexpr float InnerCorner = 1.5F;
+
+} // namespace
+
+ButtonTile ButtonTile::normal()
+{
+    return {juce::Colour(155, 159, 162), juce::Colour(116, 121, 125)};
+}
+
+ButtonTile ButtonTile::lit(juce::Colour colour)
+{
+    return {colour, colour.darker(Darkening)};
+}
+
+void ButtonTile::draw(juce::Graphics& graphics, juce::Rectangle<float> area) const
+{
+    const float opacity = isEnabled ? 1.0F : DisabledOpacity;
+    const juce::Rectangle<float> inner = area.reduced(1.0F);
+    graphics.setColour(juce::Colours::black.withAlpha(opacity));
+    graphics.fillRoundedRectangle(area, OuterCorner);
+    graphics.setGradientFill(juce::ColourGradient::vertical(top.withMultipliedAlpha(opacity), inner.getY(),
+                                                            bottom.withMultipliedAlpha(opacity), inner.getBottom()));
+    graphics.fillRoundedRectangle(inner, InnerCorner);
+    if (hasFocus)
+        drawFocusRing(graphics, inner, InnerCorner);
+}
+
+void drawFocusRing(juce::Graphics& graphics, juce::Rectangle<float> area, float cornerSize)
+{
+    graphics.setColour(toColour(Palette::lightBlue));
+    graphics.drawRoundedRectangle(area.reduced(0.75F), cornerSize, 1.5F);
+}
+
+} // namespace cadrel::gui

@@ -1,0 +1,20 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "gui/look/PictureButton.h"
+
+#include "gui/guard/Guard.h"
+
+namespace cadrel::gui {
+
+void PictureButton::setTooltip(const juce::String& tooltip)
+{
+    Button::setTooltip(tooltip);
+    setTitle(tooltip);
+}
+
+void PictureButton::paintButton(juce::Graphics& graphics, bool, bool isDown)
+{
+    guardSystem([&] { m_picture.draw(graphics, getLocalBounds(), {isDown, isEnabled(), hasKeyboardFocus(false)}); });
+}
+
+} // namespace cadrel::gui

@@ -1,0 +1,44 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/keep/Material.h"
+
+#include "tests/core/picture/Film.h"
+#include "tests/support/ThrownResult.h"
+#include "util/Result.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+namespace cadrel::tests {
+
+using core::Framerate;
+using core::framesOfMaterial;
+
+using Lines = std::vector<std::string>;
+
+TEST(Material, EveryFrameThatItReachesIntoHoldsIt)
+{
+    const Framerate framerate(24, 0);
+
+    EXPECT_EQ(linesOf(framesOfMaterial({{1.0, 2.0}}, framerate)), (Lines{"24..48"}));
+    EXPECT_EQ(linesOf(framesOfMaterial({{0.99, 2.01}}, framerate)), (Lines{"23..49"}));
+    EXPECT_EQ(linesOf(framesOfMaterial({{1.0 - 1e-6, 2.0 + 1e-6}}, framerate)), (Lines{"24..48"}));
+    EXPECT_EQ(linesOf(framesOfMaterial({{-0.01, 0.01}}, framerate)), (Lines{"-1..1"}));
+}
+
+TEST(Material, AnInstantStandsOnOneFrame)
+{
+    EXPECT_EQ(linesOf(framesOfMaterial({{1.0, 1.0}, {3.02, 3.02}}, Framerate(24, 0))), (Lines{"24..25", "72..73"}));
+}
+
+TEST(Material, WhatIsNoStretchOfTimeIsRefused)
+{
+    const double none = std::numeric_limits<double>::quiet_NaN();
+
+    EXPECT_EQ(thrownBy([] { framesOfMaterial({{2.0, 1.0}}, FrameASecond); }), util::Result::InvalidArgument);
+    EXPECT_EQ(thrownBy([&] { framesOfMaterial({{none, 1.0}}, FrameASecond); }), util::Result::InvalidArgument);
+    EXPECT_EQ(thrownBy([] { framesOfMaterial({{-1e300, 1e300}}, FrameASecond); }), util::Result::Ok);
+}
+
+} // namespace cadrel::tests

@@ -1,0 +1,163 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "gui/input/NumberEntry.h"
+
+#include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
+
+#include <cmath>
+#include <limits>
+
+using cadrel::gui::NumberEntry;
+
+namespace {
+
+NumberEntry fromTenToTwenty()
+{
+    NumberEntry entry;
+    entry.setRange(10.0, 20.0, 3.0);
+    return entry;
+}
+
+} // namespace
+
+TEST(NumberEntry, KeepsANumberWithinItsBounds)
+{
+    NumberEntry entry = fromTenToTwenty();
+
+    entry.set(9.0);
+    EXPECT_EQ(entry.value(), 10.0);
+    entry.set(10.0);
+    EXPECT_EQ(entry.value(), 10.0);
+    entry.set(20.0);
+    EXPECT_EQ(entry.value(), 20.0);
+    entry.set(21.0);
+    EXPECT_EQ(entry.value(), 20.0);
+}
+
+TEST(NumberEntry, SetsTheValueAnewWithOtherBounds)
+{
+    NumberEntry entry;
+    entry.set(50.0);
+
+    entry.setRange(0.0, 25.0, 1.0);
+    EXPECT_EQ(entry.value(), 25.0);
+    entry.setRange(30.0, 60.0, 1.0);
+    EXPECT_EQ(entry.value(), 30.0);
+}
+
+TEST(NumberEntry, TakesTheMinimumWhereItLiesAboveTheMaximum)
+{
+    NumberEntry entry;
+
+    entry.setRange(9.0, 5.0, 1.0);
+    EXPECT_EQ(entry.value(), 9.0);
+    entry.set(7.0);
+    EXPECT_EQ(entry.value(), 9.0);
+}
+
+TEST(NumberEntry, TakesTheMinimumForWhatIsNoNumber)
+{
+    NumberEntry entry = fromTenToTwenty();
+    entry.set(15.0);
+
+    entry.set(std::nan(""));
+
+    EXPECT_EQ(entry.value(), 10.0);
+}
+
+TEST(NumberEntry, StepsWithinItsBounds)
+{
+    NumberEntry entry = fromTenToTwenty();
+    entry.set(16.0);
+
+    entry.stepUp();
+    EXPECT_EQ(entry.value(), 19.0);
+    entry.stepUp();
+    EXPECT_EQ(entry.value(), 20.0);
+    entry.stepDown();
+    EXPECT_EQ(entry.value(), 17.0);
+    for (int i = 0; i < 5; ++i)
+        entry.stepDown();
+    EXPECT_EQ(entry.value(), 10.0);
+}
+
+TEST(NumberEntry, ReadsWhatIsTyped)
+{
+    NumberEntry entry = fromTenToTwenty();
+
+    entry.type("14");
+    EXPECT_EQ(entry.value(), 14.0);
+    entry.type("0013");
+    EXPECT_EQ(entry.value(), 13.0);
+    entry.type("99999999999999999999");
+    EXPECT_EQ(entry.value(), 20.0);
+}
+
+TEST(NumberEntry, ReadsAnEmptyTextAsZeroWithinTheBounds)
+{
+    NumberEntry entry = fromTenToTwenty();
+    entry.set(15.0);
+
+    entry.type("");
+
+    EXPECT_EQ(entry.value(), 10.0);
+}
+
+TEST(NumberEntry, ReadsATextThatIsNoNumberAsZero)
+{
+    NumberEntry entry;
+    for (const char* const text : {"x", "1 x", " 1", "nan", "inf"}) {
+        entry.set(15.0);
+        entry.type(text);
+        EXPECT_EQ(entry.value(), 0.0) << text;
+    }
+}
+
+TEST(NumberEntry, ReadsMoreDigitsThanANumberHoldsAsTheMaximum)
+{
+    NumberEntry entry = fromTenToTwenty();
+
+    entry.type(std::string(400, '9'));
+
+    EXPECT_EQ(entry.value(), 20.0);
+}
+
+TEST(NumberEntry, ShowsTheNumberFollowedByItsSuffix)
+{
+    NumberEntry entry;
+    entry.set(50.0);
+    entry.setSuffix("%");
+
+    EXPECT_EQ(entry.number(), "50");
+    EXPECT_EQ(entry.numberWithSuffix(), "50%");
+    entry.set(2.5);
+    EXPECT_EQ(entry.numberWithSuffix(), "2.5%");
+    entry.setRange(-5.0, 5.0, 1.0);
+    entry.set(-3.0);
+    EXPECT_EQ(entry.numberWithSuffix(), "-3%");
+}
+
+TEST(NumberEntry, ShowsTheLargestAndTheSmallestNumber)
+{
+    NumberEntry entry;
+    const double largest = std::numeric_limits<double>::max();
+    entry.setRange(-largest, largest, 1.0);
+
+    entry.set(-largest);
+    EXPECT_EQ(entry.number().size(), 310U);
+    entry.set(std::numeric_limits<double>::denorm_min());
+    EXPECT_FALSE(entry.number().empty());
+}
+
+RC_GTEST_PROP(NumberEntryLaws, TypingWhatIsShownChangesNothing, ())
+{
+    NumberEntry entry;
+    entry.setRange(-1000.0, 1000.0, 1.0);
+    entry.set(*rc::gen::inRange(-100000, 100000) / 97.0);
+    const double before = entry.value();
+
+    entry.type(entry.number());
+
+    RC_ASSERT(entry.value() == before);
+}

@@ -1,0 +1,370 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "gui/look/LookAndFeel.h"
+#include "gui/look/Text.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <functional>
+
+using namespace cadrel::gui;
+
+namespace {
+
+/// What an operation of the look and feel draws on white.
+class LookAndFeelDrawingTest : public testing::Test {
+protected:
+    juce::Image drawn(int width, int height, const std::function<void(juce::Graphics&)>& draw)
+    {
+        juce::Image image(juce::Image::RGB, width, height, true);
+        juce::Graphics graphics(image);
+        graphics.fillAll(juce::Colours::white);
+        draw(graphics);
+        return image;
+    }
+
+    juce::Image drawnButton(juce::Button& button, bool isDown)
+    {
+        button.setSize(40, 20);
+        return drawn(40, 20, [&](juce::Graphics& graphics) {
+            m_look.drawButtonBackground(graphics, button, {}, false, isDown);
+        });
+    }
+
+    /// The first and the last row of the inner field, in the middle.
+    static void expectShade(const juce::Image& image, juce::Colour top, juce::Colour bottom)
+    {
+        expectNear(image.getPixelAt(20, 0), juce::Colours::black);
+        expectNear(image.getPixelAt(0, 10), juce::Colours::black);
+        expectNear(image.getPixelAt(20, 1), top);
+        expectNear(image.getPixelAt(20, 18), bottom);
+        expectNear(image.getPixelAt(20, 19), juce::Colours::black);
+    }
+
+    static void expectNear(juce::Colour colour, juce::Colour expected)
+    {
+        EXPECT_NEAR(colour.getRed(), expected.getRed(), 4) << colour.toString();
+        EXPECT_NEAR(colour.getGreen(), expected.getGreen(), 4) << colour.toString();
+        EXPECT_NEAR(colour.getBlue(), expected.getBlue(), 4) << colour.toString();
+    }
+
+    static int countOf(const juce::Image& image, juce::Colour colour)
+    {
+        int count = 0;
+        for (int y = 0; y < image.getHeight(); ++y) {
+            for (int x = 0; x < image.getWidth(); ++x)
+                count += image.getPixelAt(x, y) == colour ? 1 : 0;
+        }
+        return count;
+    }
+
+    juce::ScopedJuceInitialiser_GUI m_juce;
+    LookAndFeel m_look;
+};
+
+} // namespace
+
+TEST_F(LookAndFeelDrawingTest, ShadesAButtonThatIsNeitherOnNorPressed)
+{
+    juce::TextButton button;
+
+    expectShade(drawnButton(button, false), {155, 159, 162}, {116, 121, 125});
+}
+
+TEST_F(LookAndFeelDrawingTest, LightsAPressedButtonThatDoesNotToggle)
+{
+    juce::TextButton button;
+
+    // 231, 232 and 233, each divided by 1.4.
+    expectShade(drawnButton(button, true), {231, 232, 233}, {165, 166, 166});
+}
+
+TEST_F(LookAndFeelDrawingTest, ShadesAButtonThatIsOnInItsOnColour)
+{
+    juce::TextButton button;
+    button.setClickingTogglesState(true);
+    button.setToggleState(true, juce::dontSendNotification);
+
+    // 163, 204 and 255, each divided by 1.4.
+    expectShade(drawnButton(button, false), {163, 204, 255}, {116, 146, 182});
+    expectShade(drawnButton(button, true), {163, 204, 255}, {116, 146, 182});
+    button.setColour(juce::TextButton::buttonOnColourId, juce::Colour(255, 173, 0));
+    expectShade(drawnButton(button, false), {255, 173, 0}, {182, 124, 0});
+}
+
+TEST_F(LookAndFeelDrawingTest, ShadesAPressedToggleInItsOnColour)
+{
+    juce::TextButton button;
+    button.setClickingTogglesState(true);
+
+    expectShade(drawnButton(button, true), {163, 204, 255}, {116, 146, 182});
+}
+
+TEST_F(LookAndFeelDrawingTest, DrawsTheButtonOfAComboBoxInItsColour)
+{
+    juce::ComboBox box;
+    juce::TextButton button;
+    box.addAndMakeVisible(button);
+    box.setColour(juce::ComboBox::buttonColourId, juce::Colour(10, 200, 30));
+
+    const juce::Image image = drawnButton(button, true);
+
+    EXPECT_EQ(image.getPixelAt(0, 0), juce::Colours::black);
+    EXPECT_EQ(image.getPixelAt(39, 19), juce::Colours::black);
+    EXPECT_EQ(image.getPixelAt(1, 1), juce::Colour(10, 200, 30));
+    EXPECT_EQ(image.getPixelAt(38, 18), juce::Colour(10, 200, 30));
+}
+
+TEST_F(LookAndFeelDrawingTest, FadesADisabledButton)
+{
+    juce::TextButton button;
+    button.setEnabled(false);
+
+    const juce::Image image = drawnButton(button, false);
+
+    // Half black on white, and on it half of the shade.
+    expectNear(image.getPixelAt(20, 0), {128, 128, 128});
+    expectNear(image.getPixelAt(20, 1), {141, 143, 145});
+}
+
+TEST_F(LookAndFeelDrawingTest, WritesButtonsInTheColourOfTheirStateAndHalfAsStrongWhenDisabled)
+{
+    juce::TextButton button("HHHHH");
+    button.setSize(80, 20);
+    button.setColour(juce::TextButton::textColourOffId, juce::Colours::red);
+    button.setColour(juce::TextButton::textColourOnId, juce::Colours::blue);
+    const auto darkest = [&] {
+        const juce::Image image =
+            drawn(80, 20, [&](juce::Graphics& graphics) { m_look.drawButtonText(graphics, button, false, false); });
+        juce::Colour found = juce::Colours::white;
+        for (int y = 0; y < 20; ++y) {
+            for (int x = 0; x < 80; ++x) {
+                const juce::Colour pixel = image.getPixelAt(x, y);
+                if (pixel.getPerceivedBrightness() < found.getPerceivedBrightness())
+                    found = pixel;
+            }
+        }
+        return found;
+    };
+
+    expectNear(darkest(), juce::Colours::red);
+    button.setToggleState(true, juce::dontSendNotification);
+    expectNear(darkest(), juce::Colours::blue);
+    button.setEnabled(false);
+    EXPECT_NEAR(darkest().getRed(), 127, 6);
+    EXPECT_EQ(m_look.getTextButtonFont(button, 20), getFont(6));
+}
+
+TEST_F(LookAndFeelDrawingTest, DrawsATickBoxWithATickOnlyWhereItIsTicked)
+{
+    juce::ToggleButton button;
+    const auto box = [&](bool isTicked) {
+        return drawn(30, 30, [&](juce::Graphics& graphics) {
+            m_look.drawTickBox(graphics, button, 5.0F, 5.0F, 20.0F, 20.0F, isTicked, true, false, false);
+        });
+    };
+
+    // 16 x 16 at 5, 7.
+    EXPECT_EQ(countOf(box(false), juce::Colours::black), 16 * 16);
+    EXPECT_EQ(box(false).getPixelAt(5, 7), juce::Colours::black);
+    EXPECT_EQ(box(false).getPixelAt(20, 22), juce::Colours::black);
+    // The tick turns at 35 % and 70 %.
+    EXPECT_EQ(box(true).getPixelAt(12, 18), toColour(Palette::sheet));
+    EXPECT_EQ(box(true).getPixelAt(5, 7), juce::Colours::black);
+}
+
+TEST_F(LookAndFeelDrawingTest, HasATickTwiceAsWideAsHigh)
+{
+    const juce::Rectangle<float> tick = m_look.getTickShape(9.0F).getBounds();
+
+    EXPECT_NEAR(tick.getWidth(), 18.0F, 0.01F);
+    EXPECT_NEAR(tick.getHeight(), 9.0F, 0.01F);
+}
+
+TEST_F(LookAndFeelDrawingTest, DrawsAComboBoxWithItsArrowWhereItIsEnabled)
+{
+    juce::ComboBox box;
+    const auto drawnBox = [&](bool isDown) {
+        return drawn(60, 20, [&](juce::Graphics& graphics) {
+            m_look.drawComboBox(graphics, 60, 20, isDown, 40, 0, 20, 20, box);
+        });
+    };
+
+    // The triangle is below the middle of the button's upper half.
+    const juce::Image enabled = drawnBox(false);
+    EXPECT_EQ(enabled.getPixelAt(20, 10), juce::Colours::black);
+    EXPECT_EQ(enabled.getPixelAt(42, 15), juce::Colour(121, 122, 123));
+    EXPECT_EQ(enabled.getPixelAt(50, 9), juce::Colours::black);
+    EXPECT_EQ(enabled.getPixelAt(59, 10), juce::Colours::black);
+    // 255 less 121 is 134, which is 95.7 when it is divided by 1.4.
+    EXPECT_NEAR(drawnBox(true).getPixelAt(42, 15).getRed(), 159, 1);
+    box.setEnabled(false);
+    EXPECT_NE(drawnBox(false).getPixelAt(50, 9), juce::Colours::black);
+    EXPECT_EQ(m_look.getComboBoxFont(box), getFont(2));
+}
+
+TEST_F(LookAndFeelDrawingTest, DrawsTheGroundOfAMenuWithAnOutline)
+{
+    const juce::Image image =
+        drawn(50, 40, [&](juce::Graphics& graphics) { m_look.drawPopupMenuBackground(graphics, 50, 40); });
+
+    EXPECT_EQ(image.getPixelAt(1, 1), juce::Colour(240, 240, 240));
+    // 240 under black at 60 %.
+    expectNear(image.getPixelAt(0, 20), {96, 96, 96});
+    expectNear(image.getPixelAt(49, 39), {96, 96, 96});
+    EXPECT_EQ(m_look.getPopupMenuFont().getHeight(), 16.0F);
+    EXPECT_FALSE(m_look.getPopupMenuFont().isBold());
+}
+
+TEST_F(LookAndFeelDrawingTest, HighlightsAnItemOfAMenuAndFadesADisabledOne)
+{
+    const auto item = [&](bool isActive, bool isHighlighted) {
+        return drawn(100, 20, [&](juce::Graphics& graphics) {
+            m_look.drawPopupMenuItem(graphics, {100, 20}, false, isActive, isHighlighted, false, false, "HHHHHH", {},
+                                     nullptr, nullptr);
+        });
+    };
+    const auto darkest = [](const juce::Image& image) {
+        int found = 255;
+        for (int y = 0; y < 20; ++y) {
+            for (int x = 0; x < 100; ++x)
+                found = std::min<int>(found, image.getPixelAt(x, y).getGreen());
+        }
+        return found;
+    };
+
+    EXPECT_EQ(item(true, false).getPixelAt(5, 5), juce::Colours::white);
+    // 163, 204 and 255 at 40 % on white.
+    expectNear(item(true, true).getPixelAt(5, 2), {218, 235, 255});
+    EXPECT_LT(darkest(item(true, false)), 20);
+    EXPECT_NEAR(darkest(item(false, false)), 178, 10);
+}
+
+TEST_F(LookAndFeelDrawingTest, DrawsASeparatorAsADarkAndALightLine)
+{
+    const juce::Image image = drawn(40, 10, [&](juce::Graphics& graphics) {
+        graphics.fillAll(juce::Colours::grey);
+        m_look.drawPopupMenuItem(graphics, {40, 10}, true, true, false, false, false, {}, {}, nullptr, nullptr);
+    });
+
+    const juce::Colour ground = juce::Colours::grey;
+    expectNear(image.getPixelAt(20, 4), ground.overlaidWith(juce::Colour(0x33000000)));
+    expectNear(image.getPixelAt(20, 5), ground.overlaidWith(juce::Colour(0x66ffffff)));
+    EXPECT_EQ(image.getPixelAt(20, 3), ground);
+    EXPECT_EQ(image.getPixelAt(20, 6), ground);
+}
+
+TEST_F(LookAndFeelDrawingTest, DrawsALabelsGroundAndOutlineAndItsTextWhileNobodyEditsIt)
+{
+    juce::Label label({}, "HHHH");
+    label.setSize(80, 20);
+    label.setFont(getFont(1));
+    label.setColour(juce::Label::backgroundColourId, juce::Colours::black);
+    label.setColour(juce::Label::outlineColourId, juce::Colours::red);
+    label.setColour(juce::Label::textColourId, juce::Colours::lime);
+    const auto greenest = [&] {
+        const juce::Image image = drawn(80, 20, [&](juce::Graphics& graphics) { m_look.drawLabel(graphics, label); });
+        EXPECT_EQ(image.getPixelAt(0, 0), juce::Colours::red);
+        EXPECT_EQ(image.getPixelAt(79, 19), juce::Colours::red);
+        EXPECT_EQ(image.getPixelAt(1, 1), juce::Colours::black);
+        int found = 0;
+        for (int y = 1; y < 19; ++y) {
+            for (int x = 1; x < 79; ++x)
+                found = std::max<int>(found, image.getPixelAt(x, y).getGreen());
+        }
+        return found;
+    };
+
+    EXPECT_GT(greenest(), 240);
+    label.setEnabled(false);
+    EXPECT_NEAR(greenest(), 128, 8);
+    label.setEnabled(true);
+    label.showEditor();
+    EXPECT_EQ(greenest(), 0);
+}
+
+TEST_F(LookAndFeelDrawingTest, FillsAProgressBarUpToTheProgress)
+{
+    double progress = 0.0;
+    juce::ProgressBar bar(progress);
+    const juce::Colour done(152, 177, 201);
+    const auto filled = [&](double part) {
+        const juce::Image image =
+            drawn(100, 10, [&](juce::Graphics& graphics) { m_look.drawProgressBar(graphics, bar, 100, 10, part, {}); });
+        EXPECT_EQ(countOf(image, done) + countOf(image, juce::Colours::black), 1000);
+        return countOf(image, done);
+    };
+
+    EXPECT_EQ(filled(0.0), 0);
+    EXPECT_EQ(filled(0.3), 300);
+    EXPECT_EQ(filled(1.0), 1000);
+    EXPECT_LE(filled(-0.1), 250);
+    EXPECT_LE(filled(1.1), 250);
+    EXPECT_LE(filled(std::nan("")), 250);
+}
+
+TEST_F(LookAndFeelDrawingTest, MovesABlockWhereTheProgressIsUnknown)
+{
+    double progress = -1.0;
+    juce::ProgressBar bar(progress);
+    const auto picture = [&] {
+        return drawn(100, 10,
+                     [&](juce::Graphics& graphics) { m_look.drawProgressBar(graphics, bar, 100, 10, -1.0, {}); });
+    };
+    const auto startOf = [](const juce::Image& image) {
+        int x = 0;
+        while (x < 100 && image.getPixelAt(x, 5) == juce::Colours::black)
+            ++x;
+        return x;
+    };
+
+    const int first = startOf(picture());
+    const auto end = juce::Time::getMillisecondCounter() + 5000;
+    while (startOf(picture()) == first && juce::Time::getMillisecondCounter() < end)
+        juce::Thread::yield();
+
+    EXPECT_NE(startOf(picture()), first);
+}
+
+TEST_F(LookAndFeelDrawingTest, DrawsATableHeaderAsABandWithItsName)
+{
+    juce::TableHeaderComponent header;
+    const juce::Image image = drawn(80, 20, [&](juce::Graphics& graphics) {
+        m_look.drawTableHeaderColumn(graphics, header, {}, 1, 80, 20, false, false, 0);
+    });
+
+    EXPECT_EQ(countOf(image, toColour(Palette::band)), 76 * 16);
+    EXPECT_EQ(image.getPixelAt(2, 2), toColour(Palette::band));
+    EXPECT_EQ(image.getPixelAt(77, 17), toColour(Palette::band));
+    EXPECT_EQ(image.getPixelAt(1, 1), juce::Colours::white);
+}
+
+TEST_F(LookAndFeelDrawingTest, PointsUpWhereValuesRiseDownTheTable)
+{
+    juce::TableHeaderComponent header;
+    const auto widthOfArrowAt = [&](int flags, int y) {
+        const juce::Image image = drawn(80, 20, [&](juce::Graphics& graphics) {
+            m_look.drawTableHeaderColumn(graphics, header, {}, 1, 80, 20, false, false, flags);
+        });
+        int width = 0;
+        for (int x = 60; x < 78; ++x)
+            width += image.getPixelAt(x, y) != toColour(Palette::band) ? 1 : 0;
+        return width;
+    };
+
+    EXPECT_LT(widthOfArrowAt(juce::TableHeaderComponent::sortedBackwards, 8),
+              widthOfArrowAt(juce::TableHeaderComponent::sortedBackwards, 12));
+    EXPECT_GT(widthOfArrowAt(juce::TableHeaderComponent::sortedForwards, 8),
+              widthOfArrowAt(juce::TableHeaderComponent::sortedForwards, 12));
+    EXPECT_EQ(widthOfArrowAt(0, 10), 0);
+}
+
+TEST_F(LookAndFeelDrawingTest, GivesMenusAndTooltipsItsLook)
+{
+    juce::TooltipWindow tooltips;
+    juce::Label popup;
+
+    EXPECT_EQ(&tooltips.getLookAndFeel(), &m_look);
+    EXPECT_EQ(&popup.getLookAndFeel(), &m_look);
+}

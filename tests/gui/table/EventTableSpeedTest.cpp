@@ -1,0 +1,123 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "gui/table/EventColumn.h"
+#include "gui/table/StoredTable.h"
+#include "gui/timeline/EventTimeLineView.h"
+#include "tests/gui/table/ShownTable.h"
+#include "tests/support/Sanitizer.h"
+#include "tests/support/SecondsOf.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <iostream>
+
+using cadrel::core::EventBase;
+using cadrel::core::Timecode;
+using cadrel::gui::EventColumn;
+using cadrel::gui::RowSet;
+using cadrel::tests::secondsOf;
+
+namespace {
+
+constexpr int EventCount = 100000;
+
+/// A list that no one has by hand: 100,000 events of a few frames.
+class EventTableSpeedTest : public cadrel::tests::ShownTable {
+protected:
+    void SetUp() override
+    {
+        Events events;
+        events.reserve(EventCount);
+        for (int index = 0; index < EventCount; ++index) {
+            auto event = std::make_shared<EventBase>();
+            event->setRollName(index % 2 == 0 ? "A017C004_261122_R1AB" : "B021C011_261122_R1AB");
+            event->setClipName("42A-" + std::to_string(index % 977));
+            const int at = index * 20;
+            event->setTimecodes(Timecode(at), Timecode(at + 20), Timecode(at), Timecode(at + 20));
+            event->setEventNumber(static_cast<std::uint32_t>(index + 1));
+            events.push_back(std::move(event));
+        }
+        list().append(events);
+        show();
+        m_reloads = false;
+    }
+
+    /// The best of some runs counts, as the machine has other work.
+    static void expectFast(const char* step, const std::function<void()>& action)
+    {
+        double best = 1e9;
+        for (int run = 0; run < 5; ++run)
+            best = std::min(best, secondsOf(action));
+        std::cout << step << ": " << best * 1000.0 << " ms\n";
+        EXPECT_LT(best, CADREL_ADDRESS_SANITIZER ? 2.0 : 0.1) << step;
+    }
+
+    void paintTable() { m_table.createComponentSnapshot(m_table.getLocalBounds(), true, 1.0F); }
+};
+
+} // namespace
+
+TEST_F(EventTableSpeedTest, EachStepOfAHundredThousandRowsIsDoneInATenthOfASecond)
+{
+    RowSet alternating;
+    for (int row = 0; row < EventCount; row += 2)
+        alternating.append(row);
+
+    expectFast("reload", [this] { m_model->reload(list()); });
+    expectFast("paint", [this] { paintTable(); });
+    bool forwards = false;
+    for (const EventColumn& column : EventColumn::all()) {
+        expectFast(("sort by column " + std::to_string(column.id)).c_str(), [&] {
+            forwards = !forwards;
+            m_model->applySort(column.id, forwards);
+        });
+    }
+    expectFast("select every other row", [&] { m_model->selectRows(alternating); });
+    expectFast("reload with every other row selected", [this] { m_model->reload(list()); });
+    expectFast("sort with every other row selected", [&] {
+        forwards = !forwards;
+        m_model->applySort(EventColumn::ClipName, forwards);
+    });
+    expectFast("select one more", [&] { m_table.flipRowSelection(50001); });
+    expectFast("paint with every other row selected", [this] { paintTable(); });
+    expectFast("select all", [&] {
+        m_table.deselectAllRows();
+        m_model->selectAll();
+    });
+    expectFast("selected events", [&] { EXPECT_EQ(m_model->getSelectedEvents().size(), 100000U); });
+    expectFast("highlight", [&] { m_model->setHighlight(list().events()); });
+    expectFast("paint with a highlight", [this] { paintTable(); });
+    int row = 0;
+    expectFast("scroll", [&] {
+        row += 15000;
+        m_table.scrollToEnsureRowIsOnscreen(row);
+        paintTable();
+    });
+    m_dataModel.oldEdl().append(list());
+    m_dataModel.newEdl().append(list());
+    expectFast("related events of one",
+               [&] { EXPECT_EQ(m_dataModel.oldEventsBehind({list().eventAt(5000)}).size(), 1U); });
+    expectFast("store the selection",
+               [&] { cadrel::gui::StoredTable(m_dataModel, 2).setSelection(m_model->getSelectedRows()); });
+    expectFast("restore the selection",
+               [&] { m_model->selectRows(cadrel::gui::StoredTable(m_dataModel, 2).selection(EventCount)); });
+    expectFast("neighbours", [&] {
+        std::size_t before = 1;
+        std::size_t after = 1;
+        EXPECT_EQ(m_model->getSelectionWithNeighbours({list().eventAt(5000)}, before, after).size(), 3U);
+    });
+}
+
+TEST_F(EventTableSpeedTest, TheTimelineOfAHundredThousandEventsIsDrawnInATenthOfASecond)
+{
+    cadrel::gui::EventTimeLineView view;
+    view.setBounds(0, 0, 1056, 80);
+    const auto paint = [&] { view.createComponentSnapshot(view.getLocalBounds(), true, 1.0F); };
+    expectFast("events", [&] { view.setEvents(list()); });
+    expectFast("highlight and paint", [&] {
+        view.highlightEvents(list().events());
+        paint();
+    });
+    expectFast("paint", paint);
+}
