@@ -195,7 +195,7 @@ void LookAndFeel::drawTextEditorOutline(juce::Graphics& graphics, int width, int
 
 void LookAndFeel::drawTableHeaderBackground(juce::Graphics& graphics, juce::TableHeaderComponent&)
 {
-    graphics.fillAll(toColour(Palette::panel));
+    guardSystem([&] { graphics.fillAll(toColour(Palette::panel)); });
 }
 
 void LookAndFeel::drawTableHeaderColumn(juce::Graphics& graphics, juce::TableHeaderComponent&, const juce::String& name,

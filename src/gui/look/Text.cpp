@@ -3,6 +3,7 @@
 #include "gui/look/Text.h"
 
 #include "gui/look/FontTable.h"
+#include "gui/look/ShownText.h"
 #include "gui/look/TextShortening.h"
 
 #include <string>
@@ -45,6 +46,11 @@ juce::Font getFont(int index)
 {
     const FontStyle style = fontStyle(index);
     return {FontFamily, style.height, style.isBold ? juce::Font::bold : juce::Font::plain};
+}
+
+juce::String translatedText(const std::wstring& text)
+{
+    return translated(text).c_str();
 }
 
 void drawText(juce::Graphics& graphics, const juce::String& text, float x, float y, float width, float height,
