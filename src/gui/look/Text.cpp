@@ -32,11 +32,18 @@ double widthOf(const juce::String& text, const juce::Font& font)
     return layout.getWidth();
 }
 
+/// Whatever the width of a text depends on. JUCE's own name of a font rounds its height and leaves out how it is stretched.
+juce::String keyOf(const juce::Font& font)
+{
+    return font.toString() + ' ' + juce::String(font.getHeight()) + ' ' + juce::String(font.getHorizontalScale()) +
+           ' ' + juce::String(font.getExtraKerningFactor());
+}
+
 juce::String shortened(const juce::String& text, double boxWidth, const juce::Font& font)
 {
     const juce::SharedResourcePointer<TextShortening> shortening;
     const auto measure = [&font](const std::wstring& part) { return widthOf(juce::String(part.c_str()), font); };
-    const std::wstring fontKey = font.toString().toWideCharPointer();
+    const std::wstring fontKey = keyOf(font).toWideCharPointer();
     return shortening->cutOnce(text.toWideCharPointer(), boxWidth, fontKey, measure).c_str();
 }
 
