@@ -24,8 +24,10 @@ run:
 	@cmake/build.sh release cadrel
 	@mkdir -p build/run
 	build/release/bin/cadrel apply $(reel3)/reel3.stage --old $(reel3)/reel3_v07.edl --new $(reel3)/reel3_v12.edl \
-	    --vfx 'VFX_****_v,_comp' -o build/run/reel3_v12.stage --overwrite --json build/run/reel3_v12.json >build/run/reel3_v12.txt
-	@sed '/^$$/q' build/run/reel3_v12.txt
+	    --vfx 'VFX_****_v,_comp' -o build/run/reel3_v12.stage --overwrite --notes build/run/reel3_notes.html \
+	    --json build/run/reel3_v12.json --clips >build/run/reel3_v12.txt
+	@sed '/^Clip by clip$$/,$$d' build/run/reel3_v12.txt
+	@echo "Every change, step by step, stands in build/run/reel3_notes.html."
 	@echo "Every move and every marker stands in build/run/reel3_v12.txt, as JSON in build/run/reel3_v12.json."
 	@echo "The project: build/release/bin/cadrel show build/run/reel3_v12.stage"
 

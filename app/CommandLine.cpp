@@ -59,12 +59,16 @@ Markers", Cadrel marks where to look: each stretch that was carried over (Destin
 transitions (Dissolve/Wipe), jumps of the automation where two stretches meet (Automation Warning), slivers of clips
 at the end of one (Audio Snippet), and stretches that want the same place of a track (Overlap).
 
-Without -o and --in-place nothing is written, and the report tells what would become of the project. The settings are
+The report has the totals and the largest changes of the picture, with what happened to the sound there. --notes FILE
+writes all changes, step by step, as a page to hand around, and --clips prints what became of each clip.
+
+Without -o and --in-place no project is written, and the report tells what would become of it. The settings are
 stored with the project: an option that isn't given is as it was in the last run. Ctrl-C takes the run back. With
 --json - only the JSON goes to standard output.
 
 Examples:
   cadrel apply reel3.stage --old reel3_v07.edl --new reel3_v12.edl -o reel3_v12.stage
+  cadrel apply reel3.stage --old reel3_v07.edl --new reel3_v12.edl --notes reel3_notes.html
   cadrel apply reel3.stage --change reel3_change.edl --in-place
   cadrel apply reel3.stage --old old.edl --new new.edl --tracks selected --overhang 6 --no-destination-markers \
       --preserve 03:02:00:00 03:05:00:00 -o scene42.stage --json report.json)";
@@ -129,9 +133,9 @@ std::string isNamed(const std::string& name)
 }
 
 /// A file to write. `name` is that of the option.
-void addOutput(CLI::App& command, const char* name, std::string& file, const char* help)
+CLI::Option* addOutput(CLI::App& command, const char* name, std::string& file, const char* help)
 {
-    command.add_option(name, file, help)->check(isNamed)->type_name("FILE");
+    return command.add_option(name, file, help)->check(isNamed)->type_name("FILE");
 }
 
 /// The file that the command is for.
@@ -322,6 +326,26 @@ void addMatching(CLI::App& command, GivenSettings& given)
     }
 }
 
+/// How change notes are laid out. Gives the options that only a file of notes needs.
+std::vector<CLI::Option*> addNotesLayout(CLI::App& command, NotesLayout& layout)
+{
+    command
+        .add_option("--simplify", layout.simplify,
+                    "Join trims that cancel out within so many frames into one step (default 0, none)")
+        ->check(CLI::Range(0, 10000))
+        ->type_name("FRAMES");
+    CLI::Option* const feet =
+        command.add_flag("--feet", layout.showsFeet, "Show places also in 35 mm feet and frames, 16 frames a foot");
+    CLI::Option* const paper =
+        command
+            .add_option_function<std::string>(
+                "--paper", [&layout](const std::string& size) { layout.isLetter = size == "letter"; },
+                "The paper of a PDF: a4 (default) or letter")
+            ->check(CLI::IsMember({"a4", "letter"}))
+            ->type_name("SIZE");
+    return {feet, paper};
+}
+
 CLI::App* addGenerate(CLI::App& program, GenerateOptions& options)
 {
     CLI::App* const generate = program.add_subcommand("generate", "Make the change EDL from an old and a new cut");
@@ -352,7 +376,15 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
     addResult(*apply, options.outputFile, options.replacing, "Where to write the project");
     apply->add_flag("--in-place", options.inPlace, "Replace the project itself")->excludes("--output");
     addOutput(*apply, "--json", options.jsonFile, AllJsonHelp);
-    apply->add_flag("--summary", options.summary, "Print the totals alone");
+    CLI::Option* const notes = addOutput(*apply, "--notes", options.notesFile,
+                                         "Also write change notes with what happened to the sound: .html, .pdf, .csv, "
+                                         ".txt or .json");
+    notes->excludes(change);
+    for (CLI::Option* const option : addNotesLayout(*apply, options.notes))
+        option->needs(notes);
+    CLI::Option* const clips =
+        apply->add_flag("--clips", options.listsClips, "Print also what became of each clip and what was marked");
+    apply->add_flag("--summary", options.summary, "Print the totals alone")->excludes(clips);
     apply
         ->add_option_function<std::string>(
             "--keep",
@@ -386,18 +418,7 @@ CLI::App* addNotes(CLI::App& program, NotesOptions& options)
     addFiles(*notes, "--new", options.generation.newFiles, "EDLs of the new cut, in order")->required();
     addResult(*notes, options.outputFile, options.replacing,
               "Where to write the notes: .html, .pdf, .csv, .txt or .json");
-    notes
-        ->add_option("--simplify", options.simplify,
-                     "Join trims that cancel out within so many frames into one step (default 0, none)")
-        ->check(CLI::Range(0, 10000))
-        ->type_name("FRAMES");
-    notes->add_flag("--feet", options.showsFeet, "Show places also in 35 mm feet and frames, 16 frames a foot");
-    notes
-        ->add_option_function<std::string>(
-            "--paper", [&options](const std::string& size) { options.isLetter = size == "letter"; },
-            "The paper of a PDF: a4 (default) or letter")
-        ->check(CLI::IsMember({"a4", "letter"}))
-        ->type_name("SIZE");
+    addNotesLayout(*notes, options.layout);
     addMatching(*notes, options.generation.settings);
     addShift(*notes, options.generation.shifts);
     addLoadOptions(*notes, options.generation.load);

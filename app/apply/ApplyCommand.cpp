@@ -5,6 +5,7 @@
 #include "app/apply/ApplyFacts.h"
 #include "app/apply/ApplyJson.h"
 #include "app/apply/ApplyListing.h"
+#include "app/apply/ApplyNotes.h"
 #include "app/apply/HostedProject.h"
 #include "app/apply/KeptRun.h"
 #include "app/apply/Plausibility.h"
@@ -17,8 +18,9 @@
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
 #include "app/edl/EventJson.h"
+#include "app/edl/ProjectClock.h"
+#include "app/notes/NotesForms.h"
 #include "app/project/ProjectAccess.h"
-#include "app/project/ProjectClock.h"
 #include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
@@ -78,6 +80,12 @@ void checkOutputs(const ApplyOptions& options)
         taken.push_back(options.outputFile);
     }
     taken.push_back(options.projectFile);
+    if (!options.notesFile.empty()) {
+        notesWriterFor("--notes", options.notesFile);
+        refuseToOverwrite(taken, options.notesFile);
+        requireReplaceable({options.notesFile}, options.replacing);
+        taken.push_back(options.notesFile);
+    }
     if (Output::isFile(options.jsonFile)) {
         refuseToOverwrite(taken, options.jsonFile);
         requireReplaceable({options.jsonFile}, options.replacing);
@@ -382,6 +390,7 @@ public:
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         m_facts.timeOrigin = hosted.project().timeOrigin();
+        m_facts.cuts = source.cuts;
         m_facts.changeNames = source.files.names;
         m_facts.changeUnread = source.files.unread;
         m_facts.settings.emplace(model.settings(), options.generation.settings, source.cuts.has_value(),
@@ -389,6 +398,7 @@ public:
         addChoices(*m_facts.settings, options);
         m_facts.written = targetOf(options);
         m_facts.jsonFile = Output::isFile(options.jsonFile) ? options.jsonFile : std::string();
+        m_facts.notesFile = options.notesFile;
         const Plausibility plausibility(model, options.projectFile, m_edls);
         if (source.cuts)
             checkCuts(plausibility, runs, terminal);
@@ -478,9 +488,17 @@ void writeReport(Output& output, const core::DataModel& model, const ApplyJson& 
         [&](std::size_t index) { return report.partsOf(index); });
 }
 
+/// Whether something is told that stands in change notes. A change EDL alone has none.
+bool wantsNotes(const ApplyOptions& options)
+{
+    const bool printsThem = !options.summary && !Output::isStandardOutput(options.jsonFile);
+    return options.changeFiles.empty() && (!options.notesFile.empty() || printsThem);
+}
+
 /// Writes the files of the run. What can fail is done before the project is written, so that there is a report of every
 /// project that is, and no report of another. Throws Failure.
-void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, const ApplyOptions& options)
+void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, const ApplyNotes* notes,
+           const ApplyOptions& options)
 {
     const std::string& target = targetOf(options);
     const auto namesToKeep = [&](const std::string& file) {
@@ -488,13 +506,22 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
     };
     Backups formerProject(namesToKeep(target));
     Backups formerReport(namesToKeep(Output::isFile(options.jsonFile) ? options.jsonFile : std::string()));
+    Backups formerNotes(namesToKeep(options.notesFile));
     facts.projectBackups = formerProject.names();
+    facts.notesBackups = formerNotes.names();
     facts.reportBackups = formerReport.names();
     std::optional<Output> report;
     if (Output::isFile(options.jsonFile)) {
         report.emplace(options.jsonFile, options.replacing.isAllowed);
         writeReport(*report, hosted.model(), ApplyJson(facts, clock));
         report->finish();
+    }
+    std::optional<Output> page;
+    if (!options.notesFile.empty()) {
+        page.emplace(options.notesFile, options.replacing.isAllowed);
+        notesWriterFor("--notes", options.notesFile)(notes->document(),
+                                                     [&page](std::string_view text) { page->write(text); });
+        page->finish();
     }
     Interruption::check();
     if (options.inPlace)
@@ -507,9 +534,37 @@ void write(HostedProject& hosted, const ProjectClock& clock, ApplyFacts& facts, 
     if (report)
         report->place();
     formerReport.keep();
+    if (page)
+        page->place();
+    formerNotes.keep();
 }
 
-void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyOptions& options)
+/// The head of the notes, where there are any.
+void printChanges(const ApplyNotes* notes)
+{
+    if (!notes)
+        return;
+    std::cout << '\n';
+    writeNotesHead(notes->document(), [](std::string_view text) { std::cout << text; });
+}
+
+void printClips(const ApplyListing& listing)
+{
+    std::cout << '\n' << ApplyListing::ClipsTitle << "\n\n";
+    listing.printMoves(std::cout);
+    std::cout << '\n';
+    listing.printMarkers(std::cout);
+}
+
+/// Where the rest of the report is.
+void printHint(const ApplyNotes* notes, const ApplyOptions& options)
+{
+    const bool canTellSteps = notes && options.notesFile.empty();
+    std::cout << (canTellSteps ? "\n--notes NOTES.html tells every step, and --clips lists every clip.\n"
+                               : "\n--clips lists every clip.\n");
+}
+
+void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyNotes* notes, const ApplyOptions& options)
 {
     if (Output::isStandardOutput(options.jsonFile)) {
         Output output(options.jsonFile, true);
@@ -519,12 +574,12 @@ void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyOption
     }
     const ApplyListing listing(facts, clock);
     listing.printTotals(std::cout);
-    if (!options.summary) {
-        std::cout << '\n';
-        listing.printMoves(std::cout);
-        std::cout << '\n';
-        listing.printMarkers(std::cout);
-    }
+    if (!options.summary)
+        printChanges(notes);
+    if (options.listsClips)
+        printClips(listing);
+    else if (!options.summary)
+        printHint(notes, options);
     flushStandardOutput();
 }
 
@@ -553,12 +608,17 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     std::optional<Interruption> interruption(std::in_place);
     terminal.clearProgress();
     apply(hosted, run.kept(), facts);
+    std::optional<ApplyNotes> notes;
+    if (wantsNotes(options)) {
+        terminal.showProgress("comparing the cuts");
+        notes.emplace(facts, clock, options.notes);
+    }
     terminal.showProgress("writing");
-    write(hosted, clock, facts, options);
+    write(hosted, clock, facts, notes ? &*notes : nullptr, options);
     interruption.reset();
 
     terminal.clearProgress();
-    print(facts, clock, options);
+    print(facts, clock, notes ? &*notes : nullptr, options);
 }
 
 } // namespace cadrel::app

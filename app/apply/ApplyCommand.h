@@ -4,6 +4,7 @@
 
 #include "app/console/Replacing.h"
 #include "app/edl/Generation.h"
+#include "app/notes/NotesDocument.h"
 
 #include <string>
 #include <vector>
@@ -24,12 +25,15 @@ struct ApplyOptions {
     std::string outputFile;               ///< empty: none is written, but for `inPlace`
     Replacing replacing;                  ///< of the output; in place the project is replaced anyway
     std::string jsonFile;                 ///< empty: none is written; "-": standard output
+    std::string notesFile;                ///< empty: none are written; its extension tells the form
+    NotesLayout notes;
     Keep keep = Keep::All;
     bool isKeepGiven = false;
-    bool isForced = false; ///< goes on where the files don't seem to belong together
-    bool isFresh = false;  ///< without what earlier runs have stored in the project
-    bool inPlace = false;  ///< the result replaces the project
-    bool summary = false;  ///< the totals alone
+    bool isForced = false;   ///< goes on where the files don't seem to belong together
+    bool isFresh = false;    ///< without what earlier runs have stored in the project
+    bool inPlace = false;    ///< the result replaces the project
+    bool summary = false;    ///< the totals alone
+    bool listsClips = false; ///< what became of each clip
 };
 
 /// `cadrel apply`: carries a sound project over to a new cut. The report is prepared before the project is written,

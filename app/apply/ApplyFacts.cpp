@@ -30,27 +30,19 @@ std::vector<const TrackComparison*> ApplyFacts::markedTracks() const
     return found;
 }
 
-FateCount& FateCount::operator+=(const TrackComparison& track)
+core::SoundCount countOf(const TrackComparison& track)
 {
     const auto count = [&track](auto test) {
         return static_cast<std::size_t>(std::count_if(track.fates.begin(), track.fates.end(), test));
     };
-    all += track.fates.size();
-    stay += count([](const Fate& fate) { return fate.stays(); });
-    moved += count([](const Fate& fate) { return fate.isMoved; });
-    trimmed += count([](const Fate& fate) { return fate.isTrimmed(); });
-    split += count([](const Fate& fate) { return fate.isSplit; });
-    doubled += count([](const Fate& fate) { return fate.isDoubled; });
-    lost += count([](const Fate& fate) { return fate.isLost(); });
-    added += track.added.size();
-    return *this;
-}
-
-FateCount countOf(const TrackComparison& track)
-{
-    FateCount count;
-    count += track;
-    return count;
+    return {track.fates.size(),
+            count([](const Fate& fate) { return fate.stays(); }),
+            count([](const Fate& fate) { return fate.isMoved; }),
+            count([](const Fate& fate) { return fate.isTrimmed(); }),
+            count([](const Fate& fate) { return fate.isSplit; }),
+            count([](const Fate& fate) { return fate.isDoubled; }),
+            count([](const Fate& fate) { return fate.isLost(); }),
+            track.added.size()};
 }
 
 } // namespace cadrel::app

@@ -40,6 +40,7 @@ struct ApplyFacts {
     std::optional<SettingsReport> settings;
     double timeOrigin = 0.0;                    ///< of the project
     std::optional<GenerationReport> generation; ///< nothing where the change EDL was given
+    std::optional<Cuts> cuts;                   ///< likewise
     std::vector<std::string> changeNames;       ///< its files then
     std::vector<UnreadOfFile> changeUnread;     ///< and their lines that were not read
     std::vector<PassedOver> passedOver;
@@ -56,22 +57,10 @@ struct ApplyFacts {
     std::vector<std::string> projectBackups; ///< the former file under its new name; empty for none
     std::string jsonFile;                    ///< the file of the report; empty for none
     std::vector<std::string> reportBackups;
+    std::string notesFile; ///< likewise of the change notes
+    std::vector<std::string> notesBackups;
 };
 
-/// How many clips and markers became what. One that was moved and trimmed counts in both.
-struct FateCount {
-    std::size_t all = 0;
-    std::size_t stay = 0;
-    std::size_t moved = 0;
-    std::size_t trimmed = 0;
-    std::size_t split = 0;
-    std::size_t doubled = 0;
-    std::size_t lost = 0;
-    std::size_t added = 0;
-
-    FateCount& operator+=(const TrackComparison& track);
-};
-
-FateCount countOf(const TrackComparison& track);
+core::SoundCount countOf(const TrackComparison& track);
 
 } // namespace cadrel::app

@@ -121,7 +121,7 @@ ordered_json ApplyJson::toJson(const Fate& fate) const
 
 ordered_json ApplyJson::toJson(const TrackComparison& track) const
 {
-    const FateCount count = countOf(track);
+    const core::SoundCount count = countOf(track);
     ordered_json changes = ordered_json::array();
     for (const Fate& fate : track.fates) {
         if (!fate.stays())

@@ -3,7 +3,7 @@
 #pragma once
 
 #include "app/apply/ApplyFacts.h"
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 
 #include <cstddef>
 #include <nlohmann/json.hpp>

@@ -6,6 +6,7 @@
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
 #include "app/edl/ScreenTimecode.h"
+#include "app/notes/SoundWording.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/time/Timecode.h"
@@ -23,24 +24,6 @@ namespace cadrel::app {
 using standin::Track;
 
 namespace {
-
-/// "300: 20 stay, 250 moved, 30 trimmed".
-std::string inWords(const FateCount& count)
-{
-    std::vector<std::string> parts;
-    const auto add = [&parts](std::size_t number, const char* what) {
-        if (number > 0)
-            parts.push_back(std::to_string(number) + " " + what);
-    };
-    add(count.stay, "stay");
-    add(count.moved, "moved");
-    add(count.trimmed, "trimmed");
-    add(count.split, "split");
-    add(count.doubled, "doubled");
-    add(count.lost, "in no cut");
-    add(count.added, "new");
-    return std::to_string(count.all) + (parts.empty() ? "" : ": ") + joined(parts);
-}
 
 std::string secondsText(double seconds)
 {
@@ -213,10 +196,10 @@ void ApplyListing::printLost(std::ostream& out) const
 
 void ApplyListing::printClips(std::ostream& out) const
 {
-    FateCount clips;
-    FateCount markers;
+    core::SoundCount clips;
+    core::SoundCount markers;
     for (const TrackComparison* const track : m_facts.userTracks())
-        (track->track->kind() == Track::Kind::Marker ? markers : clips) += *track;
+        (track->track->kind() == Track::Kind::Marker ? markers : clips) += countOf(*track);
     out << "Clips       " << inWords(clips) << '\n';
     if (markers.all + markers.added > 0)
         out << "Own markers " << inWords(markers) << '\n';
@@ -229,14 +212,14 @@ void ApplyListing::printClips(std::ostream& out) const
 void ApplyListing::printWritten(std::ostream& out) const
 {
     std::vector<std::string> written;
-    for (const std::string& file : {m_facts.written, m_facts.jsonFile}) {
+    for (const std::string& file : {m_facts.written, m_facts.notesFile, m_facts.jsonFile}) {
         if (!file.empty())
             written.push_back(toPrintable(file).text);
     }
     if (m_facts.written.empty())
         written.emplace_back("no project; give -o PROJECT.stage or --in-place");
     out << "Written     " << joined(written) << '\n';
-    for (const auto* const backups : {&m_facts.projectBackups, &m_facts.reportBackups}) {
+    for (const auto* const backups : {&m_facts.projectBackups, &m_facts.notesBackups, &m_facts.reportBackups}) {
         for (const std::string& backup : *backups)
             out << "Backup      " << toPrintable(backup).text << '\n';
     }
@@ -246,7 +229,7 @@ void ApplyListing::printTrackTotals(std::ostream& out) const
 {
     const auto rowOf = [](const TrackComparison& track) {
         const auto cell = [](std::size_t number) { return number == 0 ? std::string() : std::to_string(number); };
-        const FateCount count = countOf(track);
+        const core::SoundCount count = countOf(track);
         return Columns::Row{pathOf(*track.track), cell(count.all),     cell(count.stay),
                             cell(count.moved),    cell(count.trimmed), cell(count.split),
                             cell(count.doubled),  cell(count.lost),    cell(count.added)};

@@ -3,7 +3,7 @@
 #pragma once
 
 #include "app/apply/ApplyFacts.h"
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 
 #include <iosfwd>
 
@@ -12,6 +12,9 @@ namespace cadrel::app {
 /// What a run did to a project, for people.
 class ApplyListing {
 public:
+    /// Stands above the moves.
+    static constexpr const char* ClipsTitle = "Clip by clip";
+
     /// Both outlive the listing.
     ApplyListing(const ApplyFacts& facts, const ProjectClock& clock) : m_facts(facts), m_clock(clock) {}
 

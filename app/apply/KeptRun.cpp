@@ -6,7 +6,7 @@
 #include "app/apply/RunMaterial.h"
 #include "app/console/Failure.h"
 #include "app/console/Wording.h"
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/KeepPlanner.h"
 #include "core/keep/KeptChangeList.h"

@@ -18,6 +18,7 @@
 namespace cadrel::app {
 
 using core::ProgrammeShift;
+using core::SoundChangeKind;
 using standin::SameInstant;
 using standin::Track;
 
@@ -362,27 +363,29 @@ private:
 /// Sums up what the pieces say.
 void judge(Fate& fate)
 {
-    if (fate.isLost())
-        return;
-    std::vector<const Piece*> pieces;
     for (const Piece& piece : fate.pieces)
-        pieces.push_back(&piece);
-    std::stable_sort(pieces.begin(), pieces.end(), [](const Piece* a, const Piece* b) { return a->from < b->from; });
-
-    fate.lostAtStart = orNothing(pieces.front()->from);
-    double reached = pieces.front()->from;
-    for (const Piece* const piece : pieces) {
-        const bool isFirst = piece == pieces.front();
-        const double end = piece->from + piece->now.length();
-        fate.isMoved = fate.isMoved || std::abs(piece->shift) > SameInstant;
-        if (!isFirst && !isShorterThan(piece->from, reached) && isShorterThan(0.0, fate.before.length()))
+        fate.isMoved = fate.isMoved || std::abs(piece.shift) > SameInstant;
+    for (const FateChange& change : changesOf(fate)) {
+        const double lost = change.to - change.from;
+        switch (change.kind) {
+        case SoundChangeKind::HeadTrimmed:
+            fate.lostAtStart = lost;
+            break;
+        case SoundChangeKind::TailTrimmed:
+            fate.lostAtEnd = lost;
+            break;
+        case SoundChangeKind::Split:
             fate.isSplit = true;
-        else if (!isFirst)
+            fate.lostBetween += lost;
+            break;
+        case SoundChangeKind::Doubled:
             fate.isDoubled = true;
-        fate.lostBetween += orNothing(piece->from - reached);
-        reached = std::max(reached, end);
+            break;
+        case SoundChangeKind::FellOut:
+        case SoundChangeKind::Added:
+            break;
+        }
     }
-    fate.lostAtEnd = orNothing(fate.before.length() - reached);
 }
 
 TrackComparison compareTrack(const Track& track, const std::vector<Placement>& before, const ProgrammeShift& shift)
@@ -423,6 +426,34 @@ ProjectState stateOf(const standin::Project& project)
             state.emplace(track, contentOf(*track));
     }
     return state;
+}
+
+std::vector<FateChange> changesOf(const Fate& fate)
+{
+    const double length = fate.before.length();
+    if (fate.isLost())
+        return {{SoundChangeKind::FellOut, 0.0, length}};
+    std::vector<const Piece*> pieces;
+    for (const Piece& piece : fate.pieces)
+        pieces.push_back(&piece);
+    std::stable_sort(pieces.begin(), pieces.end(), [](const Piece* a, const Piece* b) { return a->from < b->from; });
+
+    std::vector<FateChange> changes;
+    double reached = pieces.front()->from;
+    if (orNothing(reached) > 0.0)
+        changes.push_back({SoundChangeKind::HeadTrimmed, 0.0, reached});
+    for (const Piece* const piece : pieces) {
+        if (piece != pieces.front()) {
+            if (!isShorterThan(piece->from, reached) && isShorterThan(0.0, length))
+                changes.push_back({SoundChangeKind::Split, reached, reached + orNothing(piece->from - reached)});
+            else
+                changes.push_back({SoundChangeKind::Doubled, piece->from, piece->from, piece});
+        }
+        reached = std::max(reached, piece->from + piece->now.length());
+    }
+    if (orNothing(length - reached) > 0.0)
+        changes.push_back({SoundChangeKind::TailTrimmed, reached, length});
+    return changes;
 }
 
 std::vector<TrackComparison> compare(const ProjectState& before, const standin::Project& after,

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "app/project/ProjectContent.h"
+#include "core/notes/SoundNotes.h"
 
 #include <cstddef>
 #include <map>
@@ -59,6 +60,17 @@ struct Fate {
     bool isTrimmed() const { return !isLost() && (lostAtStart > 0.0 || lostAtEnd > 0.0 || lostBetween > 0.0); }
     bool stays() const { return !isLost() && !isMoved && !isSplit && !isDoubled && !isTrimmed(); }
 };
+
+/// One thing that happened to a clip or marker.
+struct FateChange {
+    core::SoundChangeKind kind{};
+    double from = 0.0;            ///< seconds into the former clip, where what is gone begins
+    double to = 0.0;              ///< likewise, where it ends
+    const Piece* piece = nullptr; ///< what is doubled; null for the rest
+};
+
+/// All that happened to it, but for moves; in the order of the former clip. Empty for what only moved or stays.
+std::vector<FateChange> changesOf(const Fate& fate);
 
 struct TrackComparison {
     const standin::Track* track;

@@ -18,15 +18,6 @@ using standin::Track;
 
 namespace {
 
-std::optional<Velmark::int64> roleOf(const Track& track)
-{
-    const auto attribute = track.attributes().find(Velmark::AttributeKey::MarkerType);
-    if (attribute == track.attributes().end())
-        return std::nullopt;
-    const auto* role = std::get_if<Velmark::int64>(&attribute->second.value);
-    return role ? std::optional(*role) : std::nullopt;
-}
-
 bool canBeChanged(const Track& track)
 {
     return !track.isFolder() && track.kind() != Track::Kind::Ruler && !track.isLocked();
@@ -37,7 +28,7 @@ bool isChanged(const Track& track, const core::Settings& settings)
     if (!canBeChanged(track) || isMarkedByRuns(track))
         return false;
     const bool isWanted = settings.applyTo() != core::ApplyTo::SelectedTracks || track.selected();
-    return isWanted || roleOf(track) == TrackRole::Memos;
+    return isWanted || markerRoleOf(track) == TrackRole::Memos;
 }
 
 /// Parts and what lies in them.
@@ -88,9 +79,18 @@ bool RunMaterial::hasTracks() const
                        [](const Track* track) { return canBeChanged(*track) && !isMarkedByRuns(*track); });
 }
 
+std::optional<std::int64_t> markerRoleOf(const Track& track)
+{
+    const auto attribute = track.attributes().find(Velmark::AttributeKey::MarkerType);
+    if (attribute == track.attributes().end())
+        return std::nullopt;
+    const auto* role = std::get_if<Velmark::int64>(&attribute->second.value);
+    return role ? std::optional<std::int64_t>(*role) : std::nullopt;
+}
+
 bool isMarkedByRuns(const Track& track)
 {
-    const auto role = roleOf(track);
+    const auto role = markerRoleOf(track);
     return role && *role >= TrackRole::Destination && *role <= TrackRole::Overlap;
 }
 

@@ -5,6 +5,8 @@
 #include "app/project/ProjectContent.h"
 #include "core/time/SecondsRange.h"
 
+#include <cstdint>
+#include <optional>
 #include <vector>
 
 namespace cadrel::core {
@@ -34,6 +36,9 @@ private:
     const standin::Project& m_project;
     const core::Settings& m_settings;
 };
+
+/// For which markers the track is, as TrackRole numbers them; nothing for a track of the user's own.
+std::optional<std::int64_t> markerRoleOf(const standin::Track& track);
 
 /// Whether runs write markers on the track: true for all of Cadrel's marker tracks except the one for the user's memos.
 bool isMarkedByRuns(const standin::Track& track);

@@ -4,8 +4,8 @@
 
 #include "app/console/Replacing.h"
 #include "app/edl/Generation.h"
+#include "app/notes/NotesDocument.h"
 
-#include <cstdint>
 #include <string>
 
 namespace cadrel::app {
@@ -16,9 +16,7 @@ struct NotesOptions {
     GenerationOptions generation;
     std::string outputFile; ///< its extension tells the form; empty: text on standard output
     Replacing replacing;
-    std::int32_t simplify = 0;
-    bool showsFeet = false;
-    bool isLetter = false; ///< the paper of a PDF is Letter, else A4
+    NotesLayout layout;
 };
 
 /// `cadrel notes`: what has changed between two cuts, as steps to be carried out by hand. Throws Failure and UsageError.

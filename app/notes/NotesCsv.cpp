@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "app/console/Printable.h"
 #include "app/notes/NotesText.h"
 #include "app/notes/NotesWording.h"
+#include "app/notes/SoundWording.h"
 #include "core/edl/EventBase.h"
 
 #include <array>
@@ -21,6 +23,9 @@ constexpr std::string_view LineEnd = "\r\n";
 constexpr std::string_view Titles = "step,reel,action,at,from,delete,insert,move,delete_frames,insert_frames,"
                                     "move_frames,length_change_frames,offset_frames,kinds,roll,clip,old_in,new_in,"
                                     "changes,at_feet,from_feet";
+constexpr std::size_t TitleCount = 21;
+constexpr std::string_view SoundTitles = ",scenes,sound_trimmed,sound_split,sound_doubled,sound_fell_out,sound_new,"
+                                         "sound_moved,sound_tracks,automation_jumps,sound";
 
 std::string inQuotes(const std::string& text)
 {
@@ -51,7 +56,7 @@ public:
         const core::EventBase* const shot = first.newShot != nullptr ? first.newShot : first.oldShot;
         const auto time = [this](std::int32_t frames) { return frames == 0 ? "" : m_words.plainTimecode(frames); };
         const auto& notes = m_document.notes;
-        const std::array<std::string, 21> cells{
+        const std::array<std::string, TitleCount> cells{
             std::to_string(entry.number),
             std::to_string(reel + 1),
             std::string(wordOf(step.action)),
@@ -76,10 +81,50 @@ public:
         std::string row;
         for (const std::string& cell : cells)
             row.append(row.empty() ? "" : ",").append(cell);
+        if (const core::StepSound* const sound = m_words.soundOf(entry))
+            row += soundCells(*sound);
         return row.append(LineEnd);
     }
 
+    /// A row without a step.
+    std::string elsewhereRow() const
+    {
+        const core::StepSound& sound = m_document.sound->notes.elsewhere();
+        return sound.isEmpty() ? ""
+                               : ",,elsewhere" + std::string(TitleCount - 3, ',') + soundCells(sound).append(LineEnd);
+    }
+
 private:
+    std::string soundCells(const core::StepSound& sound) const
+    {
+        using core::SoundChangeKind;
+        const SoundWording words(*m_document.sound);
+        const auto number = [](std::size_t count) { return std::to_string(count); };
+        std::string tracks;
+        for (const std::size_t track : sound.tracks)
+            tracks += (tracks.empty() ? "" : ", ") + toPrintable(m_document.sound->tracks.at(track).name).text;
+        std::string lines;
+        for (const SoundLine& line : words.lines(sound))
+            lines += concatenated({lines.empty() ? "" : "; ", line.name, " at ", line.time, ": ", line.what});
+        if (const std::string rest = SoundWording::rest(sound); !rest.empty())
+            lines.append("; ").append(rest);
+        const std::array<std::string, 10> cells{
+            asText(SoundWording::scenes(sound)),
+            number(sound.count(SoundChangeKind::HeadTrimmed) + sound.count(SoundChangeKind::TailTrimmed)),
+            number(sound.count(SoundChangeKind::Split)),
+            number(sound.count(SoundChangeKind::Doubled)),
+            number(sound.count(SoundChangeKind::FellOut)),
+            number(sound.count(SoundChangeKind::Added)),
+            number(sound.movedClips),
+            asText(tracks),
+            number(sound.jumps.size()),
+            asText(lines)};
+        std::string row;
+        for (const std::string& cell : cells)
+            row.append(",").append(cell);
+        return row;
+    }
+
     static std::string kindsOf(const NoteStep& step)
     {
         std::string kinds;
@@ -108,13 +153,18 @@ private:
 void writeNotesCsv(const NotesDocument& document, const NotesSink& sink)
 {
     const CsvForm form(document);
-    sink(std::string(ByteOrderMark).append(Titles).append(LineEnd));
+    sink(std::string(ByteOrderMark)
+             .append(Titles)
+             .append(document.sound == nullptr ? std::string_view() : SoundTitles)
+             .append(LineEnd));
     for (std::size_t reel = 0; reel < document.notes.reels().size(); ++reel) {
         for (const NoteEntry& entry : document.notes.reels()[reel].entries) {
             if (entry.step() != nullptr)
                 sink(form.rowOf(entry, reel));
         }
     }
+    if (document.sound != nullptr)
+        sink(form.elsewhereRow());
 }
 
 } // namespace cadrel::app

@@ -6,6 +6,7 @@
 #include "app/console/Wording.h"
 #include "app/notes/NotesPage.h"
 #include "app/notes/NotesWording.h"
+#include "app/notes/SoundWording.h"
 
 #include <algorithm>
 #include <array>
@@ -131,6 +132,7 @@ public:
         writeReels();
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
             writeReel(reel);
+        writeElsewhere();
         writeRemarks();
         m_sink("</main>\n<script>");
         m_sink(NotesPage::Script);
@@ -152,6 +154,15 @@ private:
                number(m_words.change(totals.after - totals.before), "change of length") +
                number(time(totals.lifted), "lifted") + number(time(totals.inserted), "inserted") +
                number(time(totals.moved), "moved") + number(time(totals.doubled), "doubled") + "</ul>\n");
+        if (m_document.sound == nullptr)
+            return;
+        m_sink("<p class=\"dim\">Sound: ");
+        const char* separator = "";
+        for (const std::string& total : SoundWording(*m_document.sound).totals()) {
+            m_sink(separator + escaped(total));
+            separator = "<br>";
+        }
+        m_sink("</p>\n");
     }
 
     /// Old and new programme as strips, each kept stretch as a band from one to the other.
@@ -297,6 +308,8 @@ private:
                 m_sink(concatenated({"<label><input type=\"checkbox\" checked value=\"", value,
                                      "\"><i style=\"--hue: var(--", hue, ")\"></i>", label, "</label>"}));
         }
+        if (m_document.sound != nullptr)
+            m_sink("<button data-sound>all sound</button>");
         m_sink("<span class=\"dim\">n and p: next and previous step; + and -: zoom</span></div>\n"
                "<p class=\"left\" hidden></p>\n");
     }
@@ -327,7 +340,8 @@ private:
         for (const NoteEntry* const entry : steps) {
             m_sink(
                 concatenated({"<li><a href=\"#", idOf(*entry), "\">step ", std::to_string(entry->number), "</a>: "}) +
-                escaped(m_words.action(*entry)) + ", " + escaped(m_words.shotsOf(*entry)) + "</li>\n");
+                escaped(m_words.action(*entry)) + ", " + escaped(m_words.shotsOf(*entry)) + soundSummary(*entry) +
+                "</li>\n");
         }
         m_sink("</ol>\n");
     }
@@ -377,13 +391,14 @@ private:
             return concatenated({"<td class=\"", kind, "\">", html, "</td>"});
         };
         std::string feet;
-        if (m_document.showsFeet && !isKept)
+        if (m_document.layout.showsFeet && !isKept)
             feet = "<p class=\"change\"><small>" + escaped(m_words.inFeet(entry)) + "</small></p>";
         return "<tr id=\"" + id + "\" tabindex=\"0\"" + (isKept ? " class=\"k\"" : "") + " data-kinds=\"" +
                (isKept ? "kept" : filtersOf(*entry.step())) + "\">" +
                cell("num", isKept ? "" : std::to_string(entry.number)) +
                cell("tc", m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel)))) +
-               cell("tc", escaped(m_words.action(entry))) + cell("", isKept ? "" : changesOf(*entry.step()) + feet) +
+               cell("tc", escaped(m_words.action(entry))) +
+               cell("", isKept ? "" : changesOf(*entry.step()) + feet + soundOf(entry)) +
                cell("tc num", entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange)) +
                cell("tc num", m_words.change(entry.runningOffset)) + "</tr>\n";
     }
@@ -418,6 +433,51 @@ private:
             html += "<p class=\"change\"><small>joined from " + std::to_string(step.joined) +
                     " trims that cancel out</small></p>";
         return html;
+    }
+
+    std::string soundSummary(const NoteEntry& entry) const
+    {
+        const core::StepSound* const sound = m_words.soundOf(entry);
+        if (sound == nullptr || sound->isEmpty())
+            return {};
+        return "<br><small>sound: " + escaped(SoundWording::shortSummary(*sound)) + "</small>";
+    }
+
+    std::string soundOf(const NoteEntry& entry) const
+    {
+        const core::StepSound* const sound = m_words.soundOf(entry);
+        if (sound == nullptr)
+            return {};
+        std::string html;
+        if (!sound->scenes.empty())
+            html += "<p class=\"change\"><small>scene: " + escaped(SoundWording::scenes(*sound)) + "</small></p>";
+        return sound->isEmpty() ? html : html + soundDetails(*sound);
+    }
+
+    /// Folded, but for what it is all about.
+    std::string soundDetails(const core::StepSound& sound) const
+    {
+        const SoundWording words(*m_document.sound);
+        const std::vector<SoundLine> lines = words.lines(sound);
+        if (lines.empty())
+            return "<p class=\"change\"><span class=\"tag sound\">sound</span><small>" + escaped(words.summary(sound)) +
+                   "</small></p>";
+        std::string html = "<details class=\"sound\"><summary><span class=\"tag sound\">sound</span>" +
+                           escaped(words.summary(sound)) + "</summary><ul>";
+        for (const SoundLine& line : lines)
+            html += "<li><span class=\"tc\">" + escaped(line.time) + "</span> " + escaped(line.name) + " <small>" +
+                    escaped(line.what) + "</small></li>";
+        if (const std::string rest = SoundWording::rest(sound); !rest.empty())
+            html += "<li>" + rest + "</li>";
+        return html + "</ul></details>";
+    }
+
+    void writeElsewhere()
+    {
+        if (m_document.sound == nullptr || m_document.sound->notes.elsewhere().isEmpty())
+            return;
+        m_sink(concatenated({"<h2>", SoundWording::ElsewhereTitle, "</h2>\n",
+                             soundDetails(m_document.sound->notes.elsewhere()), "\n"}));
     }
 
     void writeRemarks()

@@ -3,6 +3,7 @@
 #include "app/edl/EventWords.h"
 #include "app/notes/NotesText.h"
 #include "app/notes/NotesWording.h"
+#include "app/notes/SoundWording.h"
 #include "core/edl/EventBase.h"
 
 #include <nlohmann/json.hpp>
@@ -25,6 +26,83 @@ std::string textOf(const ordered_json& value)
     return value.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
 }
 
+class SoundJson {
+public:
+    explicit SoundJson(const SoundDocument& document) : m_document(document) {}
+
+    ordered_json whole() const
+    {
+        ordered_json tracks = ordered_json::array();
+        for (const SoundTrack& track : m_document.tracks)
+            tracks.push_back({{"name", track.name}, {"kind", track.kind}, {"folders", track.folders}});
+        return {{"project", m_document.projectName},
+                {"clips", countJson(m_document.clips)},
+                {"markers", countJson(m_document.markers)},
+                {"sceneTrack", m_document.scenes ? ordered_json(*m_document.scenes) : ordered_json()},
+                {"automationWatched", m_document.isWatchingAutomation},
+                {"remarks", m_document.remarks},
+                {"tracks", std::move(tracks)},
+                {"elsewhere", ofStep(m_document.notes.elsewhere())}};
+    }
+
+    ordered_json ofStep(const core::StepSound& sound) const
+    {
+        ordered_json changes = ordered_json::array();
+        for (const core::SoundChange& change : sound.changes)
+            changes.push_back(changeJson(change));
+        ordered_json jumps = ordered_json::array();
+        for (const core::AutomationJump& jump : sound.jumps) {
+            ordered_json json = rangeJson(jump.place);
+            json["tracks"] = jump.where;
+            jumps.push_back(std::move(json));
+        }
+        ordered_json tracks = ordered_json::array();
+        for (const std::size_t track : sound.tracks)
+            tracks.push_back(track + 1);
+        return {{"scenes", sound.scenes},
+                {"tracks", std::move(tracks)},
+                {"movedClips", sound.movedClips},
+                {"changes", std::move(changes)},
+                {"automationJumps", std::move(jumps)}};
+    }
+
+private:
+    static ordered_json countJson(const core::SoundCount& count)
+    {
+        return {{"all", count.all},     {"stay", count.stay},       {"moved", count.moved},  {"trimmed", count.trimmed},
+                {"split", count.split}, {"doubled", count.doubled}, {"inNoCut", count.lost}, {"new", count.added}};
+    }
+
+    ordered_json changeJson(const core::SoundChange& change) const
+    {
+        ordered_json json{{"kind", wordOf(change.kind)},
+                          {"track", change.track + 1},
+                          {"trackName", m_document.tracks.at(change.track).name},
+                          {"on", change.isMarker ? "marker" : "clip"},
+                          {"name", change.name}};
+        if (!change.part.empty())
+            json["part"] = change.part;
+        if (change.kind != core::SoundChangeKind::Added)
+            json["was"] = rangeJson(change.was);
+        if (change.now)
+            json["now"] = rangeJson(*change.now);
+        else
+            json["lost"] = rangeJson(change.lost);
+        return json;
+    }
+
+    ordered_json rangeJson(const core::SecondsRange& range) const
+    {
+        const auto time = [this](double seconds) {
+            const double ofProject = seconds - m_document.clock.origin();
+            return ordered_json{{"seconds", ofProject}, {"timecode", m_document.clock.timecode(ofProject)}};
+        };
+        return {{"in", time(range.start)}, {"out", time(range.end)}};
+    }
+
+    const SoundDocument& m_document;
+};
+
 class JsonForm {
 public:
     explicit JsonForm(const NotesDocument& document) : m_document(document), m_words(document) {}
@@ -39,12 +117,14 @@ public:
         add("new", cutJson(true));
         add("rate", m_document.rate);
         add("match", m_document.matchBy == core::MatchBy::ClipName ? "clip" : "roll");
-        add("simplifyFrames", m_document.simplify);
+        add("simplifyFrames", m_document.layout.simplify);
         add("totals", totalsJson());
         add("healed", {{"events", m_document.healing.events},
                        {"members", m_document.healing.members},
                        {"bridgedGaps", m_document.healing.bridgedGaps}});
         add("largest", largestJson());
+        if (m_document.sound != nullptr)
+            add("sound", SoundJson(*m_document.sound).whole());
         sink(",\n\"reels\": [");
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
             writeReel(reel, sink);
@@ -131,7 +211,7 @@ private:
         ordered_json json{{"reel", place.reel + 1},
                           {"timecode", m_words.plainTimecode(m_document.notes.timecodeOf(place))},
                           {"frame", place.frame}};
-        if (m_document.showsFeet)
+        if (m_document.layout.showsFeet)
             json["feet"] = NotesWording::feet(place.frame);
         return json;
     }
@@ -162,6 +242,8 @@ private:
                 changes.back()["standsAt"] = placeJson(step.doubledFrom[doubled++]);
         }
         json["changes"] = std::move(changes);
+        if (const core::StepSound* const sound = m_words.soundOf(entry))
+            json["sound"] = SoundJson(*m_document.sound).ofStep(*sound);
         return json;
     }
 

@@ -24,7 +24,7 @@ p { margin: 0 0 12px; overflow-wrap: anywhere; } .dim { color: var(--dim); }
 .strip .reels { position: relative; display: block; height: 15px; overflow: hidden; font-size: 11px; }
 .reels b { position: absolute; padding-left: 3px; font-weight: 500; }
 svg { display: block; width: 100%; height: 190px; margin: 4px 0; cursor: pointer; }
-svg:focus-visible, tr:focus-visible, button:focus-visible { outline: 2px solid var(--other); outline-offset: 1px; }
+svg:focus-visible, tr:focus-visible, button:focus-visible, summary:focus-visible { outline: 2px solid var(--other); outline-offset: 1px; }
 .base { fill: var(--line); } .reel { stroke: var(--ink); stroke-width: 1.5; vector-effect: non-scaling-stroke; }
 .kept { fill: var(--kept); fill-opacity: .34; } .seen { fill: var(--kept); }
 .moved { fill: var(--moved); fill-opacity: .62; } .doubled { fill: var(--doubled); fill-opacity: .62; }
@@ -52,6 +52,10 @@ tbody tr[id] { scroll-margin-top: 20px; cursor: pointer; }
 .tag.lifted, .tag.head-trimmed, .tag.tail-trimmed { --hue: var(--lifted); }
 .tag.plus, .tag.inserted { --hue: var(--inserted); } .tag.moved { --hue: var(--moved); }
 .tag.doubled { --hue: var(--doubled); }
+.tag.sound { --hue: var(--kept); }
+details.sound { margin: 3px 0 2px; font-size: 14px; } details.sound summary { cursor: pointer; }
+details.sound ul { margin: 3px 0 5px; padding-left: 20px; list-style: none; } details.sound small { color: var(--dim); }
+details.sound .tc { display: inline-block; min-width: 8.5em; font: 12.5px ui-monospace, monospace; }
 .change { margin: 0 0 2px; overflow-wrap: break-word; } .change small { color: var(--dim); }
 ol.largest { columns: 2; column-gap: 40px; padding-left: 24px; margin: 8px 0; font-size: 14px; }
 ol.largest a { color: inherit; }
@@ -124,6 +128,11 @@ document.addEventListener('keydown', e => {
   }
   if (e.key === 'Enter' && document.activeElement.matches('tr[id]')) document.activeElement.click();
 });
+const sounds = [...document.querySelectorAll('details.sound')];
+const unfold = all => sounds.forEach(sound => { sound.open = all; });
+document.querySelectorAll('[data-sound]').forEach(b => b.addEventListener('click',
+  () => unfold(sounds.some(sound => !sound.open))));
+addEventListener('beforeprint', () => unfold(true));
 const boxes = [...document.querySelectorAll('.tools input')];
 function filter() {
   const shown = new Set(boxes.filter(b => b.checked).map(b => b.value));

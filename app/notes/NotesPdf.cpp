@@ -6,6 +6,7 @@
 #include "app/console/Wording.h"
 #include "app/notes/NotesWording.h"
 #include "app/notes/PdfPages.h"
+#include "app/notes/SoundWording.h"
 
 #include <algorithm>
 #include <array>
@@ -27,6 +28,9 @@ constexpr double Margin = 42;
 constexpr double FootHeight = 22;
 constexpr double StripHeight = 14;
 constexpr double BandHeight = 84;
+constexpr double LineHeight = 10.5;
+/// A step with more lines goes on over the page.
+constexpr std::size_t MostLinesOfAPiece = 24;
 /// Of what stands above the rows of a reel that goes on from the page before.
 constexpr double ContinuedHeight = 30;
 
@@ -62,7 +66,7 @@ class PdfForm {
 public:
     PdfForm(const NotesDocument& document, const NotesSink& sink)
         : m_document(document), m_words(document),
-          m_pages(document.isLetter ? 612.0 : 595.28, document.isLetter ? 792.0 : 841.89, sink)
+          m_pages(document.layout.isLetter ? 612.0 : 595.28, document.layout.isLetter ? 792.0 : 841.89, sink)
     {
         m_right = m_pages.width() - Margin;
         m_lengthRight = m_right - 78;
@@ -76,12 +80,15 @@ public:
         addReels();
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
             addReel(reel);
+        addElsewhere();
         addRemarks();
         drawPages();
         m_pages.finish();
     }
 
 private:
+    using Lines = std::vector<std::pair<std::string, PdfColour>>;
+
     void add(double height, std::function<void(PdfPages&, double)> draw, bool goesWithNext = false)
     {
         m_pieces.push_back({height, std::move(draw), goesWithNext, {}});
@@ -118,6 +125,10 @@ private:
         addText(concatenated({time(totals.lifted), " lifted, ", time(totals.inserted), " inserted, ",
                               time(totals.moved), " moved, ", time(totals.doubled), " doubled"}),
                 BodyFont, Ink, 13);
+        if (m_document.sound == nullptr)
+            return;
+        for (const std::string& total : SoundWording(*m_document.sound).totals())
+            addText("Sound: " + total, BodyFont, Ink, 13);
     }
 
     double xOf(std::int32_t frame) const
@@ -238,6 +249,8 @@ private:
             addText(concatenated({"step ", std::to_string(entry->number), ": ", m_words.action(*entry), ", ",
                                   m_words.shotsOf(*entry)}),
                     BodyFont, Ink, 12.5);
+            if (const core::StepSound* const sound = m_words.soundOf(*entry); sound != nullptr && !sound->isEmpty())
+                addText("        sound: " + SoundWording::shortSummary(*sound), SmallFont, Dim, 11);
         }
     }
 
@@ -308,21 +321,37 @@ private:
                 [this, &entry, reel](PdfPages&, double top) { drawTimes(entry, reel, top + 8, SmallTimeFont, Dim); });
             return;
         }
-        const std::size_t lines = linesOf(entry).size();
-        add(static_cast<double>(lines) * 10.5 + 15, [this, &entry, reel](PdfPages& pages, double top) {
-            drawTimes(entry, reel, top + 10, TimeFont, Ink);
-            double y = top + 10;
-            for (const auto& [text, colour] : linesOf(entry)) {
-                y += 10.5;
-                pages.text(Margin + 92, y, pages.fitting(text, SmallFont, m_right - Margin - 92), SmallFont, colour);
-            }
-            pages.box(Margin, y + 4, m_right - Margin, 0.4, Rule);
-        });
+        const Lines lines = linesOf(entry);
+        for (std::size_t first = 0; first < lines.size(); first += MostLinesOfAPiece) {
+            const std::size_t end = std::min(lines.size(), first + MostLinesOfAPiece);
+            Lines piece(lines.begin() + static_cast<std::ptrdiff_t>(first),
+                        lines.begin() + static_cast<std::ptrdiff_t>(end));
+            const double head = first == 0 ? 10 : 0;
+            const double foot = end == lines.size() ? 5 : 0;
+            const double height = head + static_cast<double>(piece.size()) * LineHeight + foot;
+            add(height, [this, &entry, reel, head, foot, piece = std::move(piece)](PdfPages& pages, double top) {
+                if (head > 0)
+                    drawTimes(entry, reel, top + head, TimeFont, Ink);
+                const double bottom = drawLines(pages, piece, top + head);
+                if (foot > 0)
+                    pages.box(Margin, bottom + 4, m_right - Margin, 0.4, Rule);
+            });
+        }
     }
 
-    std::vector<std::pair<std::string, PdfColour>> linesOf(const NoteEntry& entry) const
+    /// Gives the base line of the last one.
+    double drawLines(PdfPages& pages, const Lines& lines, double y)
     {
-        std::vector<std::pair<std::string, PdfColour>> lines;
+        for (const auto& [text, colour] : lines) {
+            y += LineHeight;
+            pages.text(Margin + 92, y, pages.fitting(text, SmallFont, m_right - Margin - 92), SmallFont, colour);
+        }
+        return y;
+    }
+
+    Lines linesOf(const NoteEntry& entry) const
+    {
+        Lines lines;
         for (const PictureChange& change : entry.step()->changes) {
             const ChangeWords words = m_words.describe(change);
             lines.emplace_back(concatenated({words.shot, ": ", words.what, words.more.empty() ? "" : ", ", words.more}),
@@ -331,9 +360,36 @@ private:
         if (entry.step()->joined > 1)
             lines.emplace_back(
                 concatenated({"joined from ", std::to_string(entry.step()->joined), " trims that cancel out"}), Dim);
-        if (m_document.showsFeet)
+        if (m_document.layout.showsFeet)
             lines.emplace_back(m_words.inFeet(entry), Dim);
+        if (const core::StepSound* const sound = m_words.soundOf(entry))
+            addSound(*sound, lines);
         return lines;
+    }
+
+    void addSound(const core::StepSound& sound, Lines& lines) const
+    {
+        if (!sound.scenes.empty())
+            lines.emplace_back("scene: " + SoundWording::scenes(sound), Dim);
+        if (sound.isEmpty())
+            return;
+        const SoundWording words(*m_document.sound);
+        lines.emplace_back("sound: " + words.summary(sound), Ink);
+        for (const SoundLine& line : words.lines(sound))
+            lines.emplace_back(concatenated({"    ", line.time, "  ", line.name, ": ", line.what}), Dim);
+        if (const std::string rest = SoundWording::rest(sound); !rest.empty())
+            lines.emplace_back("    " + rest, Dim);
+    }
+
+    void addElsewhere()
+    {
+        if (m_document.sound == nullptr || m_document.sound->notes.elsewhere().isEmpty())
+            return;
+        addText(std::string(SoundWording::ElsewhereTitle), HeadingFont, Ink, 32, true);
+        Lines lines;
+        addSound(m_document.sound->notes.elsewhere(), lines);
+        for (const auto& [text, colour] : lines)
+            addText(text, SmallFont, colour, 10.5);
     }
 
     void drawTimes(const NoteEntry& entry, std::size_t reel, double y, const PdfFont& font, const PdfColour& colour)

@@ -5,6 +5,7 @@
 #include "app/console/Printable.h"
 #include "app/console/Wording.h"
 #include "app/notes/NotesWording.h"
+#include "app/notes/SoundWording.h"
 
 #include <algorithm>
 
@@ -20,6 +21,8 @@ constexpr std::size_t Width = 80;
 constexpr std::size_t NumberWidth = 4;
 constexpr std::size_t ActionWidth = 35;
 constexpr std::size_t WhatWidth = 33;
+constexpr std::size_t SoundWhatWidth = 21;
+constexpr std::size_t SoundTimeWidth = 14;
 const std::string Indent(NumberWidth + 2, ' ');
 
 std::string padded(const std::string& text, std::size_t width)
@@ -34,20 +37,23 @@ std::string trimmedEnd(std::string line)
     return line + "\n";
 }
 
-/// Broken at blanks where it is too long; the further lines are indented by more.
-std::string wrapped(const std::string& text)
+/// Broken at blanks where it is too long; the further lines are indented.
+std::string wrapped(const std::string& text, const std::string& indent)
 {
     const auto widthOf = [](const std::string& part) { return toPrintable(part).width; };
     std::string lines;
-    std::string line = " ";
+    std::string line;
+    bool hasWord = false;
     for (std::size_t start = 0; start <= text.size();) {
         const std::size_t end = std::min(text.find(' ', start), text.size());
         const std::string word = text.substr(start, end - start);
-        if (widthOf(line) + 1 + widthOf(word) > Width) {
+        if (hasWord && widthOf(line) + 1 + widthOf(word) > Width) {
             lines += line + "\n";
-            line = std::string(3, ' ');
+            line = indent + word;
+        } else {
+            line.append(start == 0 ? "" : " ").append(word);
         }
-        line.append(" ").append(word);
+        hasWord = hasWord || !word.empty();
         start = end + 1;
     }
     return lines + line + "\n";
@@ -59,7 +65,9 @@ public:
 
     void write(const NotesSink& sink) const
     {
-        sink(head());
+        sink(cuts());
+        sink(figures());
+        sink(soundTotals());
         sink(largest());
         sink(reels());
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
@@ -69,25 +77,48 @@ public:
             for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
                 sink(rowText(entry, reel));
         }
+        sink(elsewhere());
         sink(remarks());
     }
 
+    void writeHead(const NotesSink& sink) const
+    {
+        sink(figures());
+        sink(largest());
+    }
+
 private:
-    std::string head() const
+    static std::string line(const std::string& title, const std::string& text)
+    {
+        return padded(title, 12) + text + "\n";
+    }
+
+    std::string cuts() const
+    {
+        return line("Old cut", m_words.cutText(false)) + line("New cut", m_words.cutText(true)) +
+               line("Frame rate", m_document.rate);
+    }
+
+    std::string figures() const
     {
         const NoteTotals& totals = m_document.notes.totals();
-        const auto line = [](const std::string& title, const std::string& text) {
-            return padded(title, 12) + text + "\n";
-        };
         const auto time = [this](std::int32_t frames) { return m_words.timecode(frames); };
-        return line("Old cut", m_words.cutText(false)) + line("New cut", m_words.cutText(true)) +
-               line("Frame rate", m_document.rate) +
-               line("Length", time(totals.before) + " before, " + time(totals.after) + " after, " +
+        return line("Length", time(totals.before) + " before, " + time(totals.after) + " after, " +
                                   m_words.change(totals.after - totals.before)) +
                line("Old picture", time(totals.kept) + " kept, " + time(totals.lifted) + " lifted") +
                line("New picture", time(totals.inserted) + " inserted, " + time(totals.doubled) + " doubled") +
                line("Moved", time(totals.moved)) +
                line("Steps", std::to_string(totals.steps) + " in " + counted(m_document.notes.reels().size(), "reel"));
+    }
+
+    std::string soundTotals() const
+    {
+        if (m_document.sound == nullptr)
+            return {};
+        std::string text;
+        for (const std::string& total : SoundWording(*m_document.sound).totals())
+            text += wrapped(padded(text.empty() ? "Sound" : "", 12) + total, std::string(12, ' '));
+        return text;
     }
 
     std::string largest() const
@@ -99,6 +130,8 @@ private:
         for (const NoteEntry* const entry : steps) {
             text += trimmedEnd(padded(numberText(entry->number), Indent.size()) +
                                padded(m_words.action(*entry), ActionWidth) + m_words.shotsOf(*entry));
+            if (const core::StepSound* const sound = m_words.soundOf(*entry); sound != nullptr && !sound->isEmpty())
+                text += wrapped(Indent + "sound: " + SoundWording::shortSummary(*sound), Indent + "  ");
         }
         return text;
     }
@@ -143,9 +176,37 @@ private:
         }
         if (entry.step()->joined > 1)
             text += Indent + "joined from " + std::to_string(entry.step()->joined) + " trims that cancel out\n";
-        if (m_document.showsFeet)
+        if (m_document.layout.showsFeet)
             text += Indent + m_words.inFeet(entry) + "\n";
+        if (const core::StepSound* const sound = m_words.soundOf(entry))
+            text += soundText(*sound);
         return text;
+    }
+
+    std::string soundText(const core::StepSound& sound) const
+    {
+        std::string text;
+        if (!sound.scenes.empty())
+            text += wrapped(Indent + "scene: " + SoundWording::scenes(sound), Indent + "  ");
+        if (sound.isEmpty())
+            return text;
+        const SoundWording words(*m_document.sound);
+        text += wrapped(Indent + "sound: " + words.summary(sound), Indent + "  ");
+        for (const SoundLine& line : words.lines(sound))
+            text += trimmedEnd(toPrintable(Indent + "  " + padded(line.what, SoundWhatWidth) + " " +
+                                               padded(line.time, SoundTimeWidth) + " " + line.name,
+                                           Width)
+                                   .text);
+        if (const std::string rest = SoundWording::rest(sound); !rest.empty())
+            text += Indent + "  " + rest + "\n";
+        return text;
+    }
+
+    std::string elsewhere() const
+    {
+        if (m_document.sound == nullptr || m_document.sound->notes.elsewhere().isEmpty())
+            return {};
+        return "\n" + std::string(SoundWording::ElsewhereTitle) + "\n" + soundText(m_document.sound->notes.elsewhere());
     }
 
     std::string remarks() const
@@ -155,7 +216,7 @@ private:
             return {};
         std::string text = "\nHealed, doubted and passed over\n";
         for (const std::string& line : lines)
-            text += wrapped(line);
+            text += wrapped("  " + line, "    ");
         return text;
     }
 
@@ -168,6 +229,11 @@ private:
 void writeNotesText(const NotesDocument& document, const NotesSink& sink)
 {
     TextForm(document).write(sink);
+}
+
+void writeNotesHead(const NotesDocument& document, const NotesSink& sink)
+{
+    TextForm(document).writeHead(sink);
 }
 
 } // namespace cadrel::app

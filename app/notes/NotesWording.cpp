@@ -330,12 +330,19 @@ std::vector<std::string> NotesWording::remarks() const
     }
     if (const std::size_t joined = m_document.notes.joinedSteps(); joined > 0)
         lines.push_back(std::to_string(joined) + " trims that cancel out within " +
-                        counted(static_cast<std::size_t>(m_document.simplify), "frame") + " are joined");
+                        counted(static_cast<std::size_t>(m_document.layout.simplify), "frame") + " are joined");
     for (const bool isNew : {false, true}) {
         addDoubts(isNew, lines);
         addUnread(isNew, lines);
     }
+    if (m_document.sound != nullptr)
+        lines.insert(lines.end(), m_document.sound->remarks.begin(), m_document.sound->remarks.end());
     return lines;
+}
+
+const core::StepSound* NotesWording::soundOf(const NoteEntry& entry) const
+{
+    return m_document.sound == nullptr || entry.step() == nullptr ? nullptr : &m_document.sound->notes.at(entry.number);
 }
 
 void NotesWording::addUnread(bool isNew, std::vector<std::string>& lines) const

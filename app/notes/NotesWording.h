@@ -71,6 +71,9 @@ public:
     /// The clip's name, or the roll's where it has none; "no picture" for a gap.
     static std::string nameOf(const core::EventBase* shot);
 
+    /// What a run has done to the sound at a step; null where the notes are only about the picture.
+    const core::StepSound* soundOf(const core::NoteEntry& entry) const;
+
     const NotesDocument& document() const { return m_document; }
 
 private:

@@ -4,9 +4,12 @@
 
 #include "app/notes/NotesText.h"
 
+#include <array>
 #include <cairo.h>
+#include <deque>
 #include <memory>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace cadrel::app {
@@ -16,12 +19,16 @@ struct PdfColour {
     double green;
     double blue;
     double alpha = 1.0;
+
+    bool operator==(const PdfColour&) const = default;
 };
 
 struct PdfFont {
-    const char* family;
-    double size; ///< in points
+    std::string_view family; ///< of a literal, which ends in 0
+    double size;             ///< in points
     bool isBold = false;
+
+    bool operator==(const PdfFont&) const = default;
 };
 
 /// Draws the pages of a PDF. Lengths are in points, from the upper left corner.
@@ -32,7 +39,7 @@ public:
 
     double width() const { return m_width; }
     double height() const { return m_height; }
-    void endPage() { cairo_show_page(m_context.get()); }
+    void endPage();
     /// Throws Failure when something couldn't be drawn.
     void finish();
 
@@ -53,11 +60,27 @@ private:
     struct Delete {
         void operator()(cairo_surface_t* surface) const { cairo_surface_destroy(surface); }
         void operator()(cairo_t* context) const { cairo_destroy(context); }
+        void operator()(cairo_scaled_font_t* font) const { cairo_scaled_font_destroy(font); }
+    };
+    /// A font with the widths of its letters, as far as they have been asked for; below 0 for the others.
+    struct Font {
+        PdfFont font;
+        std::unique_ptr<cairo_scaled_font_t, Delete> scaled;
+        std::array<double, 128> widths;
+    };
+    /// All text of a page in one font and colour. It is drawn at once, since each call costs more than its letters.
+    struct Texts {
+        cairo_scaled_font_t* font;
+        PdfColour colour;
+        std::string utf8;
+        std::vector<cairo_glyph_t> glyphs;
+        std::vector<cairo_text_cluster_t> clusters;
     };
 
     static cairo_status_t write(void* pages, const unsigned char* bytes, unsigned int count);
-    void set(const PdfFont& font, const PdfColour& colour);
-    double widthOf(const std::string& utf8);
+    Font& fontFor(const PdfFont& font);
+    static double widthOf(const std::string& utf8, Font& font);
+    Texts& textsFor(cairo_scaled_font_t* font, const PdfColour& colour);
 
     double m_width;
     double m_height;
@@ -65,6 +88,9 @@ private:
     std::string m_written;
     std::unique_ptr<cairo_surface_t, Delete> m_surface;
     std::unique_ptr<cairo_t, Delete> m_context;
+    std::deque<Font> m_fonts;
+    std::vector<Texts> m_texts;                    ///< of the page in hand
+    cairo_status_t m_wrong = CAIRO_STATUS_SUCCESS; ///< what has failed first
 };
 
 } // namespace cadrel::app

@@ -3,6 +3,7 @@
 #include "app/project/ProjectAccess.h"
 
 #include "app/console/Paths.h"
+#include "host/project/HostFramerate.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 #include "util/Result.h"
@@ -50,7 +51,7 @@ Failure writingFailure(const ProjectFileError& error, const std::string& file)
 ProjectClock clockOf(const standin::Project& project, const std::string& file)
 {
     try {
-        return {project.frameRate(), project.timeOrigin()};
+        return {host::framerateOf(project.frameRate()), project.timeOrigin()};
     } catch (const util::Result::Type&) {
         throw Failure{file, "has a frame rate at which no timecode counts", "correct the rate"};
     }

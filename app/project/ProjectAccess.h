@@ -3,7 +3,7 @@
 #pragma once
 
 #include "app/console/Failure.h"
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 #include "app/settings/SettingsReport.h"
 
 #include <string>

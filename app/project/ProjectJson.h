@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 #include "app/project/ProjectContent.h"
 #include "app/project/StoredModel.h"
 

@@ -3,7 +3,7 @@
 #pragma once
 
 #include "app/console/Columns.h"
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 #include "app/project/ProjectContent.h"
 #include "app/project/StoredModel.h"
 

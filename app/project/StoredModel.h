@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 #include "app/settings/SettingsReport.h"
 #include "core/model/DataModel.h"
 #include "util/Result.h"

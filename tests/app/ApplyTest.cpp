@@ -295,7 +295,7 @@ TEST(Apply, ThePageForPeople)
     for (const Origin origin : Origins) {
         const Scene scene(origin);
 
-        const Outcome outcome = scene.apply();
+        const Outcome outcome = scene.apply({"--clips"});
 
         EXPECT_EQ(outcome.status, 0);
         EXPECT_EQ(withoutTime(outcome.out),
@@ -314,6 +314,20 @@ Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 in no cut
 Own markers 3: 1 stay, 1 moved, 1 in no cut
 New markers 2 Destination, 1 Insert
 Written     no project; give -o PROJECT.stage or --in-place
+
+Length      00:00:30:00 before, 00:00:32:00 after, +00:00:02:00
+Old picture 00:00:28:00 kept, 00:00:02:00 lifted
+New picture 00:00:04:00 inserted, 00:00:00:00 doubled
+Moved       00:00:00:00
+Steps       2 in 1 reel
+
+The largest changes
+   2  insert 00:00:04:00                 NEW
+      sound: 1 split, on 1 track
+   1  delete 00:00:02:00                 TWO
+      sound: 1 split, 2 fell out, on 2 tracks
+
+Clip by clip
 
 track                              holds  stay  moved  trimmed  split  doubled  in no cut  new
 DIA (audio, in Dialogue)               6     1      4        1      2                   1

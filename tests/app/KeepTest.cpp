@@ -406,7 +406,7 @@ TEST(Keep, OfTheSmallExampleEachReelMovesWithItsPopAndItsTail)
     const auto result = folder / "result.stage";
 
     const Outcome outcome = runCadrel({"apply", example + "tworeels.stage", "--old", example + "old.edl", "--new",
-                                       example + "new.edl", "-o", result});
+                                       example + "new.edl", "-o", result, "--clips"});
 
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.err, "");

@@ -13,7 +13,11 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <array>
 #include <ctime>
+#include <sstream>
+#include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::app {
@@ -118,6 +122,50 @@ TEST(ProjectComparison, ClipsThatAreInSyncWithNoOtherAreFoundWhereverTheyHaveGon
         }
         return secondsToCompare(before, after, core::ProgrammeShift());
     });
+}
+
+/// A clip of ten seconds, of which pieces stand there: from where in it, and how long.
+Fate fateOf(const std::vector<std::pair<double, double>>& pieces)
+{
+    Fate fate;
+    fate.before.start = 100.0;
+    fate.before.end = 110.0;
+    for (const auto& [from, length] : pieces) {
+        Piece piece;
+        piece.from = from;
+        piece.now.start = 200.0;
+        piece.now.end = 200.0 + length;
+        fate.pieces.push_back(piece);
+    }
+    return fate;
+}
+
+/// "split 3-4".
+std::vector<std::string> changesIn(const Fate& fate)
+{
+    constexpr std::array Words{"head", "tail", "split", "doubled", "fell out"};
+    std::vector<std::string> words;
+    for (const FateChange& change : changesOf(fate)) {
+        std::ostringstream text;
+        text << Words.at(static_cast<std::size_t>(change.kind)) << ' ' << change.from << '-' << change.to;
+        words.push_back(text.str());
+    }
+    return words;
+}
+
+TEST(FateChanges, TellEachLossAndEachCut)
+{
+    using Words = std::vector<std::string>;
+
+    EXPECT_EQ(changesIn(fateOf({{0, 10}})), Words());
+    EXPECT_EQ(changesIn(fateOf({})), (Words{"fell out 0-10"}));
+    EXPECT_EQ(changesIn(fateOf({{1, 7}})), (Words{"head 0-1", "tail 8-10"}));
+    EXPECT_EQ(changesIn(fateOf({{0, 3}, {3, 7}})), (Words{"split 3-3"}));
+    EXPECT_EQ(changesIn(fateOf({{4, 6}, {0, 3}})), (Words{"split 3-4"}));
+    EXPECT_EQ(changesIn(fateOf({{0, 10}, {2, 3}})), (Words{"doubled 2-2"}));
+    EXPECT_EQ(changesIn(fateOf({{0, 4}, {3, 3}, {8, 1}})), (Words{"doubled 3-3", "split 6-8", "tail 9-10"}));
+    // Less than an instant is nothing.
+    EXPECT_EQ(changesIn(fateOf({{1e-6, 4}, {4 + 1e-6, 6 - 2e-6}})), (Words{"split 4-4"}));
 }
 
 } // namespace

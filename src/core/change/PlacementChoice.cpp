@@ -117,33 +117,39 @@ private:
     /// In list order.
     std::vector<Placement> bestOfRuns(const std::vector<const SharedStretch*>& connected) const
     {
-        struct Rest {
-            const SharedStretch* stretch;
-            std::span<const TwinGroup::Place> places;
+        // The heap moves its members about, so they are small.
+        struct Next {
+            std::size_t index; ///< of the first place that is left of a stretch
+            std::size_t stretch;
         };
-        const auto comesLater = [](const Rest& a, const Rest& b) {
-            return a.places.front().index > b.places.front().index;
-        };
-        std::vector<Rest> rests;
-        for (const SharedStretch* stretch : connected)
-            rests.push_back({stretch, stretch->group().placesByIndex});
-        std::make_heap(rests.begin(), rests.end(), comesLater);
+        const auto comesLater = [](const Next& a, const Next& b) { return a.index > b.index; };
+        std::vector<std::span<const TwinGroup::Place>> rests;
+        std::vector<Next> heap;
+        rests.reserve(connected.size());
+        heap.reserve(connected.size());
+        for (const SharedStretch* stretch : connected) {
+            heap.push_back({stretch->group().placesByIndex.front().index, rests.size()});
+            rests.push_back(stretch->group().placesByIndex);
+        }
+        std::make_heap(heap.begin(), heap.end(), comesLater);
 
         std::vector<Placement> best;
-        while (!rests.empty()) {
-            std::pop_heap(rests.begin(), rests.end(), comesLater);
-            const Rest rest = rests.back();
-            rests.pop_back();
+        best.reserve(connected.size());
+        while (!heap.empty()) {
+            std::pop_heap(heap.begin(), heap.end(), comesLater);
+            const std::size_t next = heap.back().stretch;
+            heap.pop_back();
+            std::span<const TwinGroup::Place>& rest = rests[next];
             const auto runEnd =
-                rests.empty() ? rest.places.end()
-                              : std::partition_point(rest.places.begin(), rest.places.end(), [&](const auto& place) {
-                                    return place.index < rests.front().places.front().index;
-                                });
-            const auto runLength = static_cast<std::size_t>(runEnd - rest.places.begin());
-            best.push_back(bestOfRun(*rest.stretch, rest.places.first(runLength)));
-            if (runLength < rest.places.size()) {
-                rests.push_back({rest.stretch, rest.places.subspan(runLength)});
-                std::push_heap(rests.begin(), rests.end(), comesLater);
+                heap.empty() ? rest.end() : std::partition_point(rest.begin(), rest.end(), [&](const auto& place) {
+                    return place.index < heap.front().index;
+                });
+            const auto runLength = static_cast<std::size_t>(runEnd - rest.begin());
+            best.push_back(bestOfRun(*connected[next], rest.first(runLength)));
+            rest = rest.subspan(runLength);
+            if (!rest.empty()) {
+                heap.push_back({rest.front().index, next});
+                std::push_heap(heap.begin(), heap.end(), comesLater);
             }
         }
         return best;

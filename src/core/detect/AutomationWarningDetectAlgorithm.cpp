@@ -241,7 +241,7 @@ std::vector<MarkerEntry> AutomationWarningDetectAlgorithm::detect(const CutList&
             MarkerEntry& entry =
                 warnings
                     .try_emplace(edge.key,
-                                 MarkerEntry{start, edge.time, util::StringUtil::toUtf8(L"Automation warning in "),
+                                 MarkerEntry{start, edge.time, util::StringUtil::toUtf8(NameStart),
                                              MarkerKind::AutomationWarning})
                     .first->second;
             entry.start = std::min(entry.start, start);

@@ -18,7 +18,8 @@ namespace {
 /// Gives the frames of the new programme to those of the old one, one choice after the other.
 class Assignment {
 public:
-    Assignment(const Programme& oldCut, const Programme& newCut) : m_oldCut(oldCut), m_newCut(newCut)
+    Assignment(const Programme& oldCut, const Programme& newCut)
+        : m_oldCut(oldCut), m_newCut(newCut), m_takenOld(oldCut.length()), m_takenNew(newCut.length())
     {
         const SharedPictureSearch search(oldCut);
         for (std::size_t index = 0; index < newCut.runs().size(); ++index) {
@@ -52,9 +53,9 @@ private:
 
     void keep(std::int32_t oldStart, std::int32_t newStart, std::int32_t length, bool isDoubled)
     {
-        m_takenNew.take(newStart, newStart + length);
+        m_takenNew.add(newStart, newStart + length);
         if (!isDoubled)
-            m_takenOld.take(oldStart, oldStart + length);
+            m_takenOld.add(oldStart, oldStart + length);
         m_kept.push_back({oldStart, newStart, length, isDoubled});
     }
 
@@ -65,16 +66,16 @@ private:
         const std::int32_t shift = shared.oldStart - shared.newStart;
         Offer longest{0, shared.newStart, shared.oldStart, index};
         for (std::int32_t frame = shared.newStart; frame < shared.newEnd();) {
-            const std::int32_t freeInNew = m_takenNew.nextFree(frame);
+            const std::int32_t freeInNew = m_takenNew.nextOut(frame, shared.newEnd());
             const std::int32_t free =
-                isDoubled ? freeInNew : std::max(freeInNew, m_takenOld.nextFree(frame + shift) - shift);
+                isDoubled ? freeInNew : std::max(freeInNew, m_takenOld.nextOut(frame + shift, shared.oldEnd()) - shift);
             if (free != frame) {
                 frame = free;
                 continue;
             }
-            std::int32_t end = m_takenNew.nextTaken(frame, shared.newEnd());
+            std::int32_t end = m_takenNew.nextIn(frame, shared.newEnd());
             if (!isDoubled)
-                end = m_takenOld.nextTaken(frame + shift, end + shift) - shift;
+                end = m_takenOld.nextIn(frame + shift, end + shift) - shift;
             if (end - frame > longest.length)
                 longest = {end - frame, frame, frame + shift, index};
             frame = end;
@@ -144,8 +145,8 @@ private:
     const Programme& m_oldCut;
     const Programme& m_newCut;
     std::vector<SharedPicture> m_shared;
-    TakenFrames m_takenOld;
-    TakenFrames m_takenNew;
+    FrameSet m_takenOld;
+    FrameSet m_takenNew;
     std::vector<KeptStretch> m_kept;
 };
 

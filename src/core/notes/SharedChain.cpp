@@ -5,6 +5,8 @@
 #include "core/notes/PrefixTrees.h"
 
 #include <algorithm>
+#include <bit>
+#include <cstdint>
 #include <limits>
 #include <unordered_map>
 #include <utility>
@@ -28,14 +30,52 @@ struct Chain {
     bool operator<(const Chain& other) const { return worth < other.worth; }
 };
 
+/// The frames of the old programme where stretches end, each counted once.
+class OldEnds {
+public:
+    explicit OldEnds(const std::vector<SharedPicture>& shared)
+    {
+        std::int32_t last = 0;
+        for (const SharedPicture& stretch : shared)
+            last = std::max(last, stretch.oldEnd());
+        m_words.resize(wordOf(last) + 1);
+        for (const SharedPicture& stretch : shared)
+            m_words[wordOf(stretch.oldEnd())].ends |= bitOf(stretch.oldEnd());
+        for (Word& word : m_words) {
+            word.before = m_count;
+            m_count += static_cast<std::size_t>(std::popcount(word.ends));
+        }
+    }
+
+    std::size_t count() const { return m_count; }
+    /// How many stand at the frame or before it.
+    std::size_t countUpTo(std::int32_t frame) const
+    {
+        const Word& word = m_words[wordOf(frame)];
+        const std::uint64_t upToFrame = bitOf(frame) | (bitOf(frame) - 1);
+        return word.before + static_cast<std::size_t>(std::popcount(word.ends & upToFrame));
+    }
+
+private:
+    struct Word {
+        std::uint64_t ends = 0; ///< of 64 frames, a bit each
+        std::size_t before = 0; ///< in the words before
+    };
+
+    static std::size_t wordOf(std::int32_t frame) { return static_cast<std::size_t>(frame) / 64; }
+    static std::uint64_t bitOf(std::int32_t frame) { return std::uint64_t{1} << static_cast<std::size_t>(frame) % 64; }
+
+    std::vector<Word> m_words;
+    std::size_t m_count = 0;
+};
+
 class ChainSearch {
 public:
     explicit ChainSearch(const std::vector<SharedPicture>& shared)
-        : m_shared(shared), m_chains(shared.size()), m_before(shared.size(), None), m_byOldEnd(shared.size(), Chain())
+        : m_shared(shared), m_chains(shared.size()), m_before(shared.size(), None), m_oldEnds(shared),
+          m_byOldEnd(m_oldEnds.count(), Chain())
     {
-        for (const SharedPicture& stretch : shared)
-            m_oldEnds.push_back(stretch.oldEnd());
-        std::sort(m_oldEnds.begin(), m_oldEnds.end());
+        m_byEnds.reserve(shared.size());
     }
 
     std::vector<SharedPicture> find()
@@ -58,8 +98,7 @@ private:
     void chainUp(std::size_t index, std::size_t firstOfRun)
     {
         const SharedPicture& stretch = m_shared[index];
-        const auto ended = std::upper_bound(m_oldEnds.begin(), m_oldEnds.end(), stretch.oldStart) - m_oldEnds.begin();
-        Chain best = m_byOldEnd.ofFirst(static_cast<std::size_t>(ended));
+        Chain best = m_byOldEnd.ofFirst(m_oldEnds.countUpTo(stretch.oldStart));
         best.worth += Chain::EndWorth;
         const auto consider = [&](std::size_t before) {
             const SharedPicture& earlier = m_shared[before];
@@ -90,8 +129,7 @@ private:
     void enter(std::size_t index)
     {
         const SharedPicture& stretch = m_shared[index];
-        const auto place = std::lower_bound(m_oldEnds.begin(), m_oldEnds.end(), stretch.oldEnd()) - m_oldEnds.begin();
-        m_byOldEnd.raise(static_cast<std::size_t>(place), m_chains[index]);
+        m_byOldEnd.raise(m_oldEnds.countUpTo(stretch.oldEnd()) - 1, m_chains[index]);
         m_usesOfOldRun[stretch.oldRun].push_back(index);
         const auto [joined, isNew] = m_byEnds.try_emplace(endsKey(stretch.oldEnd(), stretch.newEnd()), index);
         if (!isNew && m_chains[joined->second] < m_chains[index])
@@ -129,7 +167,7 @@ private:
     const std::vector<SharedPicture>& m_shared;
     std::vector<Chain> m_chains;       ///< the best that ends with each stretch
     std::vector<std::size_t> m_before; ///< the stretch before it in that chain
-    std::vector<std::int32_t> m_oldEnds;
+    const OldEnds m_oldEnds;
     PrefixMaximum<Chain> m_byOldEnd;
     std::unordered_map<std::int64_t, std::size_t> m_byEnds;
     std::unordered_map<std::size_t, std::vector<std::size_t>> m_usesOfOldRun;

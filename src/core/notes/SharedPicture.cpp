@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 
 #include <algorithm>
+#include <bit>
 #include <cmath>
 #include <iterator>
 #include <optional>
@@ -16,6 +17,8 @@ namespace {
 /// Of runs that use the same source, so many are looked at on each side of a place.
 constexpr std::size_t MostLookedAt = 128;
 constexpr std::size_t MostFound = 16;
+
+constexpr std::size_t FramesOfAWord = 64;
 
 std::optional<SharedPicture> share(const ShownRun& oldRun, std::size_t oldIndex, const ShownRun& newRun,
                                    std::size_t newIndex)
@@ -96,31 +99,33 @@ std::vector<SharedPicture> SharedPictureSearch::sharedWith(const ShownRun& newRu
     return found;
 }
 
-void TakenFrames::take(std::int32_t start, std::int32_t end)
+FrameSet::FrameSet(std::int32_t length) : m_words(static_cast<std::size_t>(length) / FramesOfAWord + 1, 0) {}
+
+void FrameSet::add(std::int32_t start, std::int32_t end)
 {
-    auto next = m_endByStart.lower_bound(start);
-    if (next != m_endByStart.end() && next->first == end) {
-        end = next->second;
-        next = m_endByStart.erase(next);
+    for (auto frame = static_cast<std::size_t>(start); frame < static_cast<std::size_t>(end);) {
+        const std::size_t word = frame / FramesOfAWord;
+        const std::size_t wordEnd = std::min((word + 1) * FramesOfAWord, static_cast<std::size_t>(end));
+        m_words[word] |= (~std::uint64_t{0} >> (FramesOfAWord - (wordEnd - frame))) << frame % FramesOfAWord;
+        frame = wordEnd;
     }
-    if (next != m_endByStart.begin() && std::prev(next)->second == start)
-        std::prev(next)->second = end;
-    else
-        m_endByStart.emplace_hint(next, start, end);
 }
 
-std::int32_t TakenFrames::nextTaken(std::int32_t frame, std::int32_t limit) const
+/// `passedOver` is a word whose frames are all of the kind that isn't looked for.
+std::int32_t FrameSet::next(std::int32_t frame, std::int32_t limit, std::uint64_t passedOver) const
 {
-    const auto next = m_endByStart.upper_bound(frame);
-    if (next != m_endByStart.begin() && std::prev(next)->second > frame)
-        return frame;
-    return next == m_endByStart.end() ? limit : std::min(limit, next->first);
-}
-
-std::int32_t TakenFrames::nextFree(std::int32_t frame) const
-{
-    const auto next = m_endByStart.upper_bound(frame);
-    return next == m_endByStart.begin() ? frame : std::max(frame, std::prev(next)->second);
+    if (frame >= limit)
+        return limit;
+    std::size_t word = static_cast<std::size_t>(frame) / FramesOfAWord;
+    const std::size_t lastWord = static_cast<std::size_t>(limit - 1) / FramesOfAWord;
+    std::uint64_t wanted =
+        (m_words[word] ^ passedOver) & (~std::uint64_t{0} << static_cast<std::size_t>(frame) % FramesOfAWord);
+    while (wanted == 0 && word < lastWord)
+        wanted = m_words[++word] ^ passedOver;
+    if (wanted == 0)
+        return limit;
+    const std::size_t found = word * FramesOfAWord + static_cast<std::size_t>(std::countr_zero(wanted));
+    return std::min(limit, static_cast<std::int32_t>(found));
 }
 
 } // namespace cadrel::core

@@ -6,7 +6,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <map>
 #include <unordered_map>
 #include <vector>
 
@@ -43,18 +42,21 @@ private:
     std::unordered_map<std::int32_t, Material> m_materials;
 };
 
-/// Stretches of frames that are taken, none twice.
-class TakenFrames {
+/// A set of frames of a programme.
+class FrameSet {
 public:
-    /// No frame from `start` to before `end` is taken yet.
-    void take(std::int32_t start, std::int32_t end);
-    /// Where the first taken frame stands from `frame` on, or `limit` where that is before it.
-    std::int32_t nextTaken(std::int32_t frame, std::int32_t limit) const;
-    /// The first frame from `frame` on that isn't taken.
-    std::int32_t nextFree(std::int32_t frame) const;
+    /// Of a programme of so many frames; empty at first.
+    explicit FrameSet(std::int32_t length);
+
+    void add(std::int32_t start, std::int32_t end);
+    /// The first frame from `frame` on that is in the set, or isn't; `limit` where there is none before it.
+    std::int32_t nextIn(std::int32_t frame, std::int32_t limit) const { return next(frame, limit, 0); }
+    std::int32_t nextOut(std::int32_t frame, std::int32_t limit) const { return next(frame, limit, ~std::uint64_t{0}); }
 
 private:
-    std::map<std::int32_t, std::int32_t> m_endByStart;
+    std::int32_t next(std::int32_t frame, std::int32_t limit, std::uint64_t passedOver) const;
+
+    std::vector<std::uint64_t> m_words; ///< 64 frames each
 };
 
 } // namespace cadrel::core

@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "app/project/ProjectClock.h"
+#include "app/edl/ProjectClock.h"
 
 #include "app/edl/ProjectFramerate.h"
 #include "app/edl/ScreenTimecode.h"
 #include "core/time/Timecode.h"
-#include "host/project/HostFramerate.h"
 
 #include <array>
 #include <cmath>
@@ -26,11 +25,6 @@ std::string signOf(double frame)
 }
 
 } // namespace
-
-ProjectClock::ProjectClock(const Velmark::FrameRateInfo& rate, double origin)
-    : m_framerate(host::framerateOf(rate)), m_origin(origin)
-{
-}
 
 std::string ProjectClock::rateLabel() const
 {

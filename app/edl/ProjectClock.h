@@ -3,7 +3,6 @@
 #pragma once
 
 #include "core/time/Framerate.h"
-#include "velmark/Project.h"
 
 #include <string>
 
@@ -13,14 +12,14 @@ namespace cadrel::app {
 /// midnight has a minus.
 class ProjectClock {
 public:
-    /// `origin` is what the clock shows at time 0, in seconds. Throws Result::NotSupported for a rate that no timecode
-    /// counts at.
-    ProjectClock(const Velmark::FrameRateInfo& rate, double origin);
+    /// `origin` is what the clock shows at time 0, in seconds.
+    ProjectClock(const core::Framerate& framerate, double origin) : m_framerate(framerate), m_origin(origin) {}
 
     /// The label of the rate, and in words what it stands for: "29.97 dfps (drop-frame, pulled down)".
     std::string rateInWords() const;
     std::string rateLabel() const;
     const core::Framerate& framerate() const { return m_framerate; }
+    double origin() const { return m_origin; }
 
     /// For programs: the timecode of a time of the project to the nearest frame, and for a length.
     std::string timecode(double seconds) const { return toText(m_origin + seconds); }
