@@ -98,8 +98,12 @@ std::optional<Host::Document> Host::activeDocument()
 int32 Host::projectOpened(IProjectDocument* project)
 {
     const Result::Type result = resultOf([&] { open(project); });
-    if (result != Result::Ok)
-        showAlert(loadingAlert(result));
+    if (result == Result::Ok)
+        return result;
+    const std::shared_ptr<Project> opened = find(project);
+    showAlert(opened && opened->hasReadModel()
+                  ? L"Not all tracks of the project can be read. Those of a preview may still be locked."
+                  : loadingAlert(result));
     return result;
 }
 

@@ -14,6 +14,7 @@
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/RecordingListener.h"
 #include "tests/support/host/AdaptedHost.h"
+#include "tests/support/host/FakeProject.h"
 #include "util/StringUtil.h"
 #include "velmark/Attributes.h"
 
@@ -451,6 +452,17 @@ TEST_F(HostNotificationsTest, SaysThatDataAreIgnoredWhichTheHostDoesNotGive)
 
     EXPECT_EQ(host.alerts->messages, (Messages{LoadFailed, LoadFailed}));
     EXPECT_TRUE(host.model().changeEdl().isEmpty());
+}
+
+TEST_F(HostNotificationsTest, SaysThatNotAllTracksCanBeReadWhereTheDataHaveBeenLoaded)
+{
+    const auto project = FakeProject::withoutUsableTrack();
+
+    EXPECT_EQ(host.adapter().projectOpened(project.get()), Result::HostObjectMissing);
+
+    EXPECT_EQ(host.alerts->messages,
+              Messages{u"Not all tracks of the project can be read. Those of a preview may still be locked."});
+    host.adapter().projectClosing(project.get(), 0);
 }
 
 TEST_F(HostNotificationsTest, WorksOnWithAnEmptyModelWhenNothingCouldBeLoaded)

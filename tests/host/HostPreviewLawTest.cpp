@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 // The law of previews, for random projects and whatever the user does meanwhile: once the last one has ended, each of the
-// user's tracks has the bytes that it had before, and beside them what the user himself has laid there.
+// user's tracks has the bytes that it had before, and beside them what the user himself has laid there, what he has made of
+// copies, and his automation before the preview.
 
 #include "host/project/Project.h"
 #include "tests/host/RandomRun.h"
@@ -38,7 +39,7 @@ public:
 
     void takeStep()
     {
-        switch (m_chance.below(12)) {
+        switch (m_chance.below(15)) {
         case 0:
             run.adapter->setPreviewActive(true);
             break;
@@ -73,6 +74,13 @@ public:
         case 10:
             runAndUndo();
             break;
+        case 11:
+        case 12:
+            editCopy();
+            break;
+        case 13:
+            addPoint();
+            break;
         default:
             failToPreview();
         }
@@ -97,7 +105,7 @@ public:
             for (const json& event : now[index]["events"]) {
                 const std::string name = nameOf(event);
                 if (name.starts_with(Laid))
-                    laid.insert(describe(index, name, event["start"], event["end"]));
+                    laid.insert(describe(index, name, event["start"], endOf(event)));
                 else
                     others.push_back(event);
             }
@@ -112,6 +120,8 @@ public:
                     laid.insert(describe(OfMemos, name, memo->getStart(nullptr), memo->getEnd(nullptr)));
             }
         }
+        for (std::size_t index = 0; index < now.size(); ++index)
+            takePoints(index, now[index], laid);
         RC_ASSERT(laid == laidByUser());
         expectSame(now, m_film);
         if (m_laid.empty())
@@ -132,6 +142,8 @@ private:
     }
 
     static constexpr const char* Laid = "laid ";
+    /// One that random projects have no points on.
+    static constexpr std::int32_t UsersCurve = 8;
     /// In the place of the index of a track.
     static constexpr std::size_t OfMemos = 1000;
 
@@ -216,6 +228,82 @@ private:
         RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
         m_laid.push_back({entry, describe(index, name, start, end)});
     }
+    /// Makes a copy in the preview the user's own: he names it and leaves it, takes it elsewhere or cuts it.
+    void editCopy()
+    {
+        const Tracks user = run.usersTracks();
+        std::vector<std::pair<std::size_t, Counted<standin::Event>>> copies;
+        for (std::size_t index = 0; index < user.size(); ++index) {
+            for (const auto& child : standin::tests::childrenOf(*user[index])) {
+                if (child->getStart(nullptr) > 2.0 * EndOfFilm &&
+                    !std::string(ConstString(child->getName()).text8()).starts_with(Laid))
+                    copies.emplace_back(index,
+                                        Counted<standin::Event>::share(dynamic_cast<standin::Event*>(child.get())));
+            }
+        }
+        if (copies.empty())
+            return;
+        const auto [index, copy] = m_chance.oneOf(copies);
+        const std::string name = Laid + std::to_string(m_laid.size());
+        const std::u16string entry(name.begin(), name.end());
+        standin::EditService& edits = run.application.edits();
+        RC_ASSERT(edits.begin(true) == ResultOk);
+        copy->setName(entry);
+        if (m_chance.oneIn(3)) {
+            const double by = static_cast<double>(m_chance.below(200)) / 8.0;
+            copy->setSpan(copy->start() + by, copy->end() + by);
+        } else if (m_chance.oneIn(2)) {
+            copy->setSpan(copy->start(), copy->start() + copy->length() / 2.0);
+        }
+        m_laid.push_back({entry, describe(index, name, copy->start(), copy->end())});
+        RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
+    }
+    /// Automation of the user's, which is the same value everywhere, between the film and the preview. In the stretch of a
+    /// preview it goes with the copies.
+    void addPoint()
+    {
+        const Tracks user = run.usersTracks();
+        std::vector<std::pair<std::size_t, standin::Track*>> fitting;
+        for (std::size_t index = 0; index < user.size(); ++index) {
+            if (user[index]->hasAutomation())
+                fitting.emplace_back(index, user[index]);
+        }
+        if (fitting.empty())
+            return;
+        const auto [index, track] = m_chance.oneOf(fitting);
+        const std::string name = Laid + std::to_string(m_laid.size());
+        const std::u16string entry(name.begin(), name.end());
+        const double time = 2.0 * EndOfFilm + static_cast<double>(m_laid.size());
+        const auto point = makeCounted<standin::AutomationPoint>();
+        point->setName(entry);
+        point->setSpan(time, time);
+        point->setValue(0.75);
+        standin::EditService& edits = run.application.edits();
+        RC_ASSERT(edits.begin(true) == ResultOk);
+        point->insertInto(track->curve(UsersCurve));
+        RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
+        m_laid.push_back({entry, describe(index, name, time, 0.75)});
+    }
+    /// Moves the points of the user's from a stored track to what is laid; there are no others on his curve.
+    static void takePoints(std::size_t track, json& stored, std::multiset<std::string>& laid)
+    {
+        const auto curves = stored.find("curves");
+        if (curves == stored.end())
+            return;
+        json others = json::array();
+        for (const json& curve : *curves) {
+            if (curve["number"] != UsersCurve) {
+                others.push_back(curve);
+                continue;
+            }
+            for (const json& point : curve["points"])
+                laid.insert(describe(track, nameOf(point), point["time"], point["value"]));
+        }
+        if (others.empty())
+            stored.erase("curves");
+        else
+            stored["curves"] = others;
+    }
     void reopen()
     {
         run.project.announceStoring();
@@ -294,6 +382,12 @@ private:
     {
         const auto name = event.find("name");
         return name != event.end() && name->is_string() ? name->get<std::string>() : std::string();
+    }
+    static double endOf(const json& event)
+    {
+        // A point marker has none.
+        const auto end = event.find("end");
+        return end != event.end() ? end->get<double>() : event["start"].get<double>();
     }
     static std::string describe(std::size_t track, const std::string& name, double start, double end)
     {

@@ -6,6 +6,7 @@
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
+#include "standin/project/ClipEvent.h"
 #include "standin/project/Track.h"
 #include "tests/host/PreviewedFilm.h"
 #include "tests/host/project/AlteredEdits.h"
@@ -114,6 +115,20 @@ TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasMadeOfACopy)
     adapter().setPreviewActive(false);
 
     EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86404"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesACopyThatTheUserHasRenamedAndOneThatPlaysFromElsewhere)
+{
+    previewAll();
+    const std::vector<Node> copies = standin::tests::childrenOf(*track);
+    ASSERT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "two 86400-86410", "one 86410-86420"}));
+    rename(copies[2], u"two, the better take");
+    host.edit(u"Slip", [&] { dynamic_cast<standin::ClipEvent&>(*copies[3]).setSourceOffset(0.5); });
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track),
+              (Texts{"one 0-10", "two 10-20", "two, the better take 86400-86410", "one 86410-86420"}));
 }
 
 TEST_P(HostPreviewStretchTest, LeavesOtherTracksAsTheyAre)
@@ -408,6 +423,32 @@ TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasTakenToWhereTheNewCutHasNothi
     adapter().setPreviewActive(false);
 
     EXPECT_EQ(host.contentOf(memos), all);
+}
+
+TEST_P(HostPreviewStretchTest, LetsMemosFollowByTheFrameRateUnderWhichItWasWritten)
+{
+    addMemos({{u"click", 6.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    // 01:00:00:00 is 3603.6 s at this rate.
+    host.project.setFrameRate({24000.0 / 1001.0, FrameRateInfo::Flag::PulledDown});
+    host.idle();
+    for (const bool isReopened : {false, true}) {
+        SCOPED_TRACE(isReopened);
+        if (isReopened)
+            reopen();
+        const Node click = standin::tests::childrenOf(*memos)[1];
+
+        host.edit(u"Move", [&] { click->setStart(nullptr, 0, Day + host.inHost(17.0)); });
+        EXPECT_EQ(host.contentOf(memos), (Texts{"click 7-7", "click 86417-86417"}));
+        host.edit(u"Move", [&] { click->setStart(nullptr, 0, Day + host.inHost(11.0)); });
+        EXPECT_EQ(host.contentOf(memos), (Texts{"click 1-1", "click 86411-86411"}));
+    }
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos), Texts{"click 1-1"});
 }
 
 TEST_P(HostPreviewStretchTest, TakesCopiesAwayWhoseMemosHaveFollowedThemAndWereRenamedSince)

@@ -3,6 +3,8 @@
 #include "host/project/MemoSync.h"
 
 #include "core/edl/EventBase.h"
+#include "host/project/MemoPlaces.h"
+#include "host/project/PlacedMemos.h"
 #include "host/track/CoveredRanges.h"
 #include "host/track/Instant.h"
 #include "host/track/Marker.h"
@@ -10,12 +12,9 @@
 #include "util/Result.h"
 
 #include <algorithm>
-#include <bit>
 #include <cmath>
-#include <cstddef>
 #include <functional>
 #include <limits>
-#include <numeric>
 #include <optional>
 #include <utility>
 
@@ -25,122 +24,11 @@ using Velmark::IHostContext;
 
 namespace cadrel::host {
 
-/// A memo where it stands, in seconds of the project's clock.
-struct PlacedMemo {
-    HostEvent event;
-    SecondsRange span;
-    std::int64_t id;
-};
-
-namespace {
-
-/// Numbers in an order, of which the highest of any stretch is found at once.
-class Highest {
-public:
-    static constexpr double None = -std::numeric_limits<double>::infinity();
-
-    explicit Highest(const std::vector<double>& numbers)
-        : m_leaves(std::bit_ceil(std::max<std::size_t>(numbers.size(), 1))), m_tree(2 * m_leaves, None)
-    {
-        std::ranges::copy(numbers, m_tree.begin() + static_cast<std::ptrdiff_t>(m_leaves));
-        for (std::size_t node = m_leaves - 1; node > 0; --node)
-            m_tree[node] = std::max(m_tree[2 * node], m_tree[2 * node + 1]);
-    }
-
-    /// Of those from `first` up to `last`; None when there are none.
-    double among(std::size_t first, std::size_t last) const
-    {
-        double highest = None;
-        for (first += m_leaves, last += m_leaves; first < last; first /= 2, last /= 2) {
-            if (first % 2 != 0)
-                highest = std::max(highest, m_tree[first++]);
-            if (last % 2 != 0)
-                highest = std::max(highest, m_tree[--last]);
-        }
-        return highest;
-    }
-    /// Gives each index up to `last` at which the number is that high, in order.
-    template <class Visit>
-    void visit(double least, std::size_t last, const Visit& visit) const
-    {
-        descend(1, 0, m_leaves, least, last, visit);
-    }
-
-private:
-    template <class Visit>
-    void descend(std::size_t node, std::size_t first, std::size_t count, double least, std::size_t last,
-                 const Visit& visit) const
-    {
-        if (first >= last || m_tree[node] < least)
-            return;
-        if (count == 1)
-            return visit(first);
-        descend(2 * node, first, count / 2, least, last, visit);
-        descend(2 * node + 1, first + count / 2, count / 2, least, last, visit);
-    }
-
-    std::size_t m_leaves;
-    std::vector<double> m_tree; ///< each from 1 on is the higher one of 2 * i and 2 * i + 1
-};
-
-} // namespace
-
-/// The memos of a track where they stood when they were read, in the order of their starts.
-class PlacedMemos {
-public:
-    explicit PlacedMemos(const Track& track) : m_memos(read(track)), m_ends(endsOf(m_memos)) {}
-
-    const std::vector<PlacedMemo>& all() const { return m_memos; }
-    /// Gives those that may have something in a range.
-    template <class Visit>
-    void visitTouching(const SecondsRange& range, const Visit& visit) const
-    {
-        const auto last = std::ranges::partition_point(
-            m_memos, [&range](const PlacedMemo& memo) { return isBefore(memo.span.start, range.end); });
-        m_ends.visit(range.start - core::SameInstant, static_cast<std::size_t>(last - m_memos.begin()),
-                     [&](std::size_t index) { visit(m_memos[index]); });
-    }
-
-private:
-    static std::vector<PlacedMemo> read(const Track& track)
-    {
-        std::vector<PlacedMemo> memos;
-        for (HostEvent& event : track.clipEvents()) {
-            const SecondsRange span{event.getStart(), event.getEnd()};
-            const std::int64_t id = event.getUserId();
-            memos.push_back({std::move(event), span, id});
-        }
-        std::ranges::stable_sort(memos, {}, [](const PlacedMemo& memo) { return memo.span.start; });
-        return memos;
-    }
-    static Highest endsOf(const std::vector<PlacedMemo>& memos)
-    {
-        std::vector<double> ends;
-        for (const PlacedMemo& memo : memos)
-            ends.push_back(memo.span.end);
-        return Highest(ends);
-    }
-
-    std::vector<PlacedMemo> m_memos;
-    Highest m_ends;
-};
-
 namespace {
 
 bool isEmpty(const SecondsRange& range)
 {
     return !isBefore(range.start, range.end);
-}
-
-bool reachesInto(const SecondsRange& memo, const SecondsRange& range)
-{
-    return isBefore(memo.start, range.end) && isBefore(range.start, memo.end);
-}
-
-/// A range doesn't hold its end, and what is copied doesn't either.
-bool liesIn(const SecondsRange& memo, const SecondsRange& range)
-{
-    return countsAsIn(memo, range) && isBefore(memo.start, range.end);
 }
 
 std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
@@ -150,44 +38,6 @@ std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
         ids.insert(memo.id);
     return ids;
 }
-
-/// Memos in an order, from which those of an id are taken, the first one first.
-class MemosById {
-public:
-    explicit MemosById(std::vector<PlacedMemo> memos)
-    {
-        for (PlacedMemo& memo : memos) {
-            m_indexes.emplace(memo.id, m_memos.size());
-            m_memos.emplace_back(std::move(memo));
-        }
-    }
-
-    std::size_t size() const { return m_indexes.size(); }
-    /// Nothing when there is none.
-    std::optional<PlacedMemo> take(std::int64_t id)
-    {
-        const auto found = m_indexes.lower_bound({id, 0});
-        if (found == m_indexes.end() || found->first != id)
-            return std::nullopt;
-        std::optional<PlacedMemo> memo = std::exchange(m_memos[found->second], std::nullopt);
-        m_indexes.erase(found);
-        return memo;
-    }
-    /// Those that are left.
-    std::vector<PlacedMemo> rest() const
-    {
-        std::vector<PlacedMemo> memos;
-        for (const std::optional<PlacedMemo>& memo : m_memos) {
-            if (memo)
-                memos.push_back(*memo);
-        }
-        return memos;
-    }
-
-private:
-    std::vector<std::optional<PlacedMemo>> m_memos;
-    std::set<std::pair<std::int64_t, std::size_t>> m_indexes;
-};
 
 /// The new ids that are given to memos of a track one after the other.
 class NewIds {
@@ -205,82 +55,6 @@ public:
 private:
     const Track& m_memos;
     std::optional<std::int64_t> m_last;
-};
-
-/// Where a memo belongs among stretches that don't overlap.
-class Places {
-public:
-    /// The stretches are given in the order in which they are preferred.
-    explicit Places(const std::vector<SecondsRange>& stretches)
-        : m_order(sorted(stretches)), m_stretches(stretches), m_preference(preferences(m_order))
-    {
-    }
-
-    struct Belongs {
-        std::optional<std::size_t> inside;  ///< the first stretch in which most of it lies
-        std::optional<std::size_t> touched; ///< the first into which it reaches
-    };
-    Belongs find(const SecondsRange& memo) const
-    {
-        const auto first = static_cast<std::size_t>(
-            std::ranges::partition_point(m_order,
-                                         [&](std::size_t at) { return isBefore(m_stretches[at].end, memo.start); }) -
-            m_order.begin());
-        const auto last = static_cast<std::size_t>(
-            std::ranges::partition_point(m_order,
-                                         [&](std::size_t at) { return !isBefore(memo.end, m_stretches[at].start); }) -
-            m_order.begin());
-        Belongs found;
-        // Between those at its ends, it sticks out of each on both sides.
-        constexpr std::size_t Ends = 3;
-        const std::size_t middle = std::min(first + Ends, last);
-        const std::size_t middleEnd = std::max(middle, last - std::min(last, Ends));
-        for (std::size_t index = first; index < middle; ++index)
-            look(memo, index, found);
-        for (std::size_t index = middleEnd; index < last; ++index)
-            look(memo, index, found);
-        prefer(found.touched, m_preference.among(middle, middleEnd));
-        const auto from = [this](std::size_t index) { return m_order.begin() + static_cast<std::ptrdiff_t>(index); };
-        const auto most = std::partition_point(from(middle), from(middleEnd),
-                                               [&](std::size_t at) { return !liesIn(memo, m_stretches[at]); });
-        prefer(found.inside, m_preference.among(static_cast<std::size_t>(most - m_order.begin()), middleEnd));
-        return found;
-    }
-
-private:
-    static std::vector<std::size_t> sorted(const std::vector<SecondsRange>& stretches)
-    {
-        std::vector<std::size_t> order(stretches.size());
-        std::iota(order.begin(), order.end(), std::size_t{0});
-        std::ranges::sort(order, {}, [&](std::size_t at) { return stretches[at].start; });
-        return order;
-    }
-    static Highest preferences(const std::vector<std::size_t>& order)
-    {
-        std::vector<double> preferences;
-        for (const std::size_t at : order)
-            preferences.push_back(-static_cast<double>(at));
-        return Highest(preferences);
-    }
-    static void prefer(std::optional<std::size_t>& found, double preference)
-    {
-        if (preference == Highest::None)
-            return;
-        const auto at = static_cast<std::size_t>(-preference);
-        found = std::min(found.value_or(at), at);
-    }
-    void look(const SecondsRange& memo, std::size_t index, Belongs& found) const
-    {
-        const std::size_t at = m_order[index];
-        if (liesIn(memo, m_stretches[at]))
-            found.inside = std::min(found.inside.value_or(at), at);
-        if (reachesInto(memo, m_stretches[at]))
-            found.touched = std::min(found.touched.value_or(at), at);
-    }
-
-    std::vector<std::size_t> m_order; ///< by their starts
-    const std::vector<SecondsRange>& m_stretches;
-    Highest m_preference;
 };
 
 } // namespace
@@ -353,7 +127,7 @@ MemoSync::Preview MemoSync::previewOf(const PlacedMemos& memos, const Previewed&
     std::vector<SecondsRange> stretches;
     for (const Shown& shown : preview.shown)
         stretches.push_back(shown.stretch.preview);
-    const Places places(stretches);
+    const MemoPlaces places(stretches);
 
     const double offset = previewed.offset + previewed.moved;
     std::vector<std::pair<Shown*, PlacedMemo>> reaching;

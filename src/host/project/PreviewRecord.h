@@ -2,13 +2,14 @@
 
 #pragma once
 
+#include "core/time/Framerate.h"
 #include "velmark/Counted.h"
 #include "velmark/ProjectNode.h"
 
+#include <array>
 #include <cstdint>
 #include <map>
 #include <optional>
-#include <utility>
 #include <vector>
 
 namespace Velmark {
@@ -23,13 +24,18 @@ class Track;
 /// track keeps it in an attribute, which follows the host's undo list and is stored with the project. Only what is written
 /// down here is ever taken away again; all else in the stretch is the user's.
 ///
-/// Times are seconds from the time origin, and stay true when that moves.
+/// Times are seconds from the time origin, and stay true when that moves. The numbers of the attribute are:
+///
+///     start, 1, frame rate, its flags, end      the end lies before the start where nothing is written
+///     start, end, source offset, name           of each event, the name as a number that is made of it
+///
+/// or, in earlier projects, only the start, or the start and the end, followed by those of each event.
 class PreviewRecord {
 public:
     using Node = Velmark::Counted<Velmark::IProjectNode>;
 
-    /// Of all that stands on the track from `start` on.
-    static PreviewRecord ofContent(const Track& track, double start);
+    /// Of all that stands on the track from `start` on; an unknown rate is kept as none.
+    static PreviewRecord ofContent(const Track& track, double start, const core::Framerate& framerate);
     /// The one that the track keeps; nothing for a track that keeps none, and for an attribute that makes no sense.
     static std::optional<PreviewRecord> keptBy(const Track& track);
     /// Whether the track has the attribute, whatever it says.
@@ -41,22 +47,29 @@ public:
     double start() const { return m_start; }
     /// Of the last event or automation point; nothing when nothing is written.
     std::optional<double> end() const { return m_end; }
-    /// Those of the events that aren't written down here, or don't begin and end where they did. Nothing else of an event is
-    /// compared.
+    /// Under which it was written; nothing where that isn't known.
+    std::optional<core::Framerate> framerate() const { return m_framerate; }
+    /// Those of the events that aren't written down here: they begin or end elsewhere, play from elsewhere in their clips, or
+    /// have another name. Nothing else of an event is compared, and of a record of earlier projects only the place.
     std::vector<Node> others(std::vector<Node> events) const;
 
 private:
-    /// Where an event begins and ends, in instants.
-    using Place = std::pair<std::int64_t, std::int64_t>;
+    /// Of an event: where it begins and ends, how far into its clip it begins to play, in instants, and its name.
+    using Content = std::array<std::int64_t, 4>;
 
     explicit PreviewRecord(double start) : m_start(start) {}
-    void add(double start, double end);
+    static std::optional<PreviewRecord> ofPlaces(const std::vector<double>& numbers);
+    static std::optional<PreviewRecord> ofNumbers(const std::vector<double>& numbers);
+    Content contentOf(const std::array<double, 4>& event) const;
+    void add(const std::array<double, 4>& event);
     void reachTo(double time);
 
     double m_start;
     std::optional<double> m_end;
-    std::map<Place, std::int64_t> m_events; ///< and how many of them are there
-    std::vector<double> m_numbers;          ///< as they are stored: the start, the end, and both of each event
+    std::optional<core::Framerate> m_framerate;
+    bool m_hasPlacesAlone = false;
+    std::map<Content, std::int64_t> m_events; ///< and how many of them are there
+    std::vector<double> m_numbers;            ///< of each event, as they are stored
 };
 
 /// The events and parts of a track that lie in a stretch or reach into it, in seconds from the time origin.

@@ -264,13 +264,6 @@ void Project::onProjectEdited(IEditTransaction& transaction)
     failure.raise();
 }
 
-MemoSync::Previewed Project::previewed()
-{
-    const double start = requiredOffset() - timeOrigin();
-    return {m_previewEvents->events(), getFramerate(), requiredOffset(), timeOrigin(),
-            writtenFrom().value_or(start) - start};
-}
-
 void Project::syncMemos(IEditTransaction& transaction)
 {
     Track& memos = markerTrack(TrackRole::Memos);

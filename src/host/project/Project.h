@@ -85,6 +85,8 @@ public:
     /// preview comes out of it, the tracks are unlocked. Throws ChecksumMismatch and what the model's reading throws; the
     /// model is empty then. It is read also where the tracks can't be, for which HostObjectMissing is thrown.
     void load();
+    /// Whether the last load has read the model, or there was none to read.
+    bool hasReadModel() const { return m_hasReadModel; }
     /// Replaces what is stored. After a failure, what was stored before is there, but when it is the previewed events alone
     /// that can't be stored, the rest is. After a load that failed because another version has stored it, the first save puts
     /// that aside, under keys of its own.
@@ -179,9 +181,10 @@ public:
     /// Lets the tracks keep what was written since then, also those with nothing that collectLockTracks has found. Carries
     /// out all, and throws the first failure at the end.
     void rememberWritten();
-    /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there since stays, and so does
-    /// what he has moved or given another length; a copy that he has changed in no other way than by its name, its gain or
-    /// the like goes. Automation in the stretch stays only on tracks on which nothing was written.
+    /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
+    /// since stays, and so does what he has moved, renamed, slipped or given another length; a copy that he has changed in no
+    /// other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
+    /// written.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces.
@@ -231,13 +234,12 @@ private:
     Velmark::IParameter& locator(const char* name) const;
     void tellListeners(FirstFailure& failure);
     bool isPreviewing() const;
+    /// With the rate and the time origin of when it was written.
     MemoSync::Previewed previewed();
     /// Of the last event of any track, from the time origin.
     double contentEnd();
     /// Of the last automation point.
     double latestPoint(const std::vector<Track>& tracks) const;
-    /// Where what is shown begins, from the time origin; nothing when nothing is. It doesn't move with the origin.
-    std::optional<double> writtenFrom();
     void syncMemos(Velmark::IEditTransaction& transaction);
 
     // Tracks of the system.
@@ -300,6 +302,7 @@ private:
     mutable core::Framerate m_framerate; ///< unknown until it's read
     const std::shared_ptr<core::EventList> m_previewEvents = std::make_shared<core::EventList>(core::ListKind::Change);
     ProjectEnd m_end;
+    bool m_hasReadModel = true;
     bool m_isOfOtherVersion = false; ///< what is stored, so that it couldn't be read
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;

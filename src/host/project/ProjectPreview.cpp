@@ -96,10 +96,12 @@ void Project::rememberWritten()
     const std::optional<double> start = std::exchange(m_writingFrom, std::nullopt);
     if (!start)
         return;
+    core::Framerate framerate;
+    resultOf([&] { framerate = getFramerate(); });
     FirstFailure failure;
     for (const Track& track : cadrelTracks()) {
         failure.ofStep([&] {
-            const PreviewRecord record = PreviewRecord::ofContent(track, *start);
+            const PreviewRecord record = PreviewRecord::ofContent(track, *start, framerate);
             if (record.end() || std::ranges::find(m_lockedTracks, track) != m_lockedTracks.end())
                 record.keepOn(m_hostContext, track);
         });
@@ -189,13 +191,22 @@ void Project::findPreviewedTracks()
     }
 }
 
-std::optional<double> Project::writtenFrom()
+MemoSync::Previewed Project::previewed()
 {
+    const double offset = requiredOffset();
+    const double origin = timeOrigin();
+    double written = offset - origin;
+    std::optional<core::Framerate> framerate;
     for (const Track& track : cadrelTracks()) {
-        if (const auto record = PreviewRecord::keptBy(track))
-            return record->start();
+        if (const auto record = PreviewRecord::keptBy(track)) {
+            written = record->start();
+            framerate = record->framerate();
+            break;
+        }
     }
-    return std::nullopt;
+    // Neither the time origin nor the rate moves what was written.
+    return {m_previewEvents->events(), framerate ? *framerate : getFramerate(), offset, origin,
+            written - (offset - origin)};
 }
 
 double Project::latestPoint(const std::vector<Track>& tracks) const

@@ -124,6 +124,7 @@ void Project::load()
     // First, so that a track that can't be handled doesn't let the next save replace what nobody has read.
     failure.ofStep([this] {
         const Result::Type result = resultOf([this] { readModel(); });
+        m_hasReadModel = result == Result::Ok;
         m_isOfOtherVersion = result == Result::NewerVersion || result == Result::UnknownVersion;
         // The model has emptied itself, but for the VFX patterns that it has read.
         if (result != Result::Ok)

@@ -131,7 +131,8 @@ protected:
     void keepAsWritten()
     {
         for (const Track& written : host.adapter.cadrelTracks())
-            PreviewRecord::ofContent(written, Day - host.origin).keepOn(host.context(), written);
+            PreviewRecord::ofContent(written, Day - host.origin, core::Framerate(25, 0))
+                .keepOn(host.context(), written);
         host.adapter.startWriting();
     }
 

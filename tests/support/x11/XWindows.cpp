@@ -12,6 +12,20 @@
 
 namespace cadrel::tests {
 
+namespace {
+
+/// Xlib makes a new text for each keysym that is the number of a character, which nobody can give back.
+std::string nameOf(KeySym symbol)
+{
+    constexpr KeySym Unicode = 0x01000000;
+    if ((symbol & 0xff000000) == Unicode)
+        return "character " + std::to_string(symbol - Unicode);
+    const char* const name = XKeysymToString(symbol);
+    return name ? name : "key " + std::to_string(symbol);
+}
+
+} // namespace
+
 class XWindows::XWindow : public standin::NativeWindow {
 public:
     XWindow(XWindows& owner, const std::string& title, int width, int height, Listener& listener)
@@ -65,8 +79,7 @@ public:
             XKeyEvent key = event.xkey;
             KeySym symbol = NoSymbol;
             XLookupString(&key, nullptr, 0, &symbol, nullptr);
-            m_owner.m_keyEvents.push_back((event.type == KeyPress ? "press " : "release ") +
-                                          std::string(XKeysymToString(symbol)));
+            m_owner.m_keyEvents.push_back((event.type == KeyPress ? "press " : "release ") + nameOf(symbol));
             if (event.type == KeyPress)
                 m_owner.m_keys.push_back(XLookupKeysym(&key, 0));
             break;

@@ -1,0 +1,223 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "host/project/PreviewRecord.h"
+
+#include "host/border/NumberList.h"
+#include "standin/project/ClipEvent.h"
+#include "tests/support/host/TrackHost.h"
+#include "velmark/Attributes.h"
+#include "velmark/String.h"
+
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <string>
+#include <vector>
+
+using namespace Velmark;
+
+namespace cadrel::host {
+
+using tests::TrackHost;
+using Names = std::vector<std::string>;
+using Numbers = std::vector<double>;
+
+namespace {
+
+/// A track with two clips that were there before, and with what was written from 100 s on.
+class PreviewRecordTest : public testing::Test {
+protected:
+    PreviewRecordTest()
+    {
+        host.addClip(node, u"film", 0.0, 10.0);
+        host.addClip(node, u"late", 95.0, 120.0);
+    }
+
+    void addCopies()
+    {
+        host.addClip(node, u"one", 100.0, 110.0);
+        host.addClip(node, u"two", 110.0, 130.0);
+    }
+    PreviewRecord record(const core::Framerate& framerate = core::Framerate(25, 0)) const
+    {
+        return PreviewRecord::ofContent(track, 100.0, framerate);
+    }
+    void keep(const PreviewRecord& kept)
+    {
+        host.edit(u"Keep", [&] { kept.keepOn(host.context(), track); });
+    }
+    std::optional<PreviewRecord> kept() const { return PreviewRecord::keptBy(track); }
+    void store(const Numbers& numbers) { writeNumbers(host.context(), *node, AttributeKey::Preview, numbers); }
+
+    TrackHost::Node child(std::size_t index) { return standin::tests::childrenOf(*node)[index]; }
+    Names othersOf(const PreviewRecord& written)
+    {
+        Names names;
+        for (const auto& event : written.others(eventsReachingInto(track, 100.0, 1000.0)))
+            names.push_back(ConstString(event->getName()).text8());
+        return names;
+    }
+
+    TrackHost host{0.0};
+    const TrackHost::Node node = host.addTrack(TypeWord::Audio, u"DX");
+    const Track track = host.handle(node);
+};
+
+} // namespace
+
+TEST_F(PreviewRecordTest, KnowsWhatWasWrittenWhenItIsReadAgain)
+{
+    addCopies();
+    keep(record());
+
+    ASSERT_TRUE(kept());
+    EXPECT_EQ(kept()->start(), 100.0);
+    EXPECT_EQ(kept()->end(), 130.0);
+    EXPECT_EQ(othersOf(*kept()), Names{"late"});
+}
+
+TEST_F(PreviewRecordTest, KnowsNoEndWhereNothingWasWritten)
+{
+    keep(record());
+
+    ASSERT_TRUE(kept());
+    EXPECT_EQ(kept()->start(), 100.0);
+    EXPECT_FALSE(kept()->end());
+    EXPECT_EQ(othersOf(*kept()), Names{"late"});
+}
+
+TEST_F(PreviewRecordTest, ReachesToTheLastPointOfItsAutomation)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    host.addPoint(node, volume, 99.0, 0.5F);
+    EXPECT_FALSE(record().end());
+
+    host.addPoint(node, volume, 100.0, 0.5F);
+    EXPECT_EQ(record().end(), 100.0);
+    host.addPoint(node, volume, 140.0, 0.5F);
+    addCopies();
+    keep(record());
+
+    EXPECT_EQ(kept()->end(), 140.0);
+}
+
+TEST_F(PreviewRecordTest, KeepsTheFrameRate)
+{
+    const std::vector<core::Framerate> framerates{core::Framerate(25, 0), core::Framerate(30, true, 1),
+                                                  core::Framerate(24, true, 0), core::Framerate(30, 1)};
+    for (const core::Framerate& framerate : framerates) {
+        keep(record(framerate));
+
+        ASSERT_TRUE(kept()->framerate());
+        EXPECT_EQ(kept()->framerate()->rate, framerate.rate);
+        EXPECT_EQ(kept()->framerate()->framesPerSecond, framerate.framesPerSecond);
+        EXPECT_EQ(kept()->framerate()->dropFrame, framerate.dropFrame);
+        EXPECT_EQ(kept()->framerate()->pulledDown, framerate.pulledDown);
+    }
+    keep(record(core::Framerate()));
+    EXPECT_FALSE(kept()->framerate());
+}
+
+TEST_F(PreviewRecordTest, TellsWhatWasMovedTrimmedRenamedOrSlippedFromWhatWasWritten)
+{
+    addCopies();
+    keep(record());
+    const TrackHost::Node copy = child(3);
+    ASSERT_EQ(std::u16string(copy->getName()), u"two");
+    auto& clip = dynamic_cast<standin::ClipEvent&>(*copy);
+    const std::vector<std::function<void()>> edits{
+        [&] { copy->setStart(nullptr, 0, 110.04); }, [&] { copy->setEnd(nullptr, 0, 129.96); },
+        [&] { copy->setName(nullptr, standin::tests::text(u"two").get(), 0), clip.setSourceOffset(0.04); }};
+    for (const auto& change : edits) {
+        host.edit(u"Edit", change);
+        EXPECT_EQ(othersOf(*kept()), (Names{"late", "two"}));
+        ASSERT_TRUE(host.undo());
+        EXPECT_EQ(othersOf(*kept()), Names{"late"});
+    }
+
+    host.edit(u"Rename", [&] { copy->setName(nullptr, standin::tests::text(u"twO").get(), 0); });
+    EXPECT_EQ(othersOf(*kept()), (Names{"late", "twO"}));
+}
+
+TEST_F(PreviewRecordTest, TellsACopyOfACopyThatTheUserHasLaidOverIt)
+{
+    addCopies();
+    host.addClip(node, u"one", 100.0, 110.0);
+    keep(record());
+    EXPECT_EQ(othersOf(*kept()), Names{"late"});
+
+    host.addClip(node, u"one", 100.0, 110.0);
+
+    EXPECT_EQ(othersOf(*kept()), (Names{"late", "one"}));
+}
+
+TEST_F(PreviewRecordTest, ReadsThoseOfEarlierProjectsWhichKnowPlacesAlone)
+{
+    addCopies();
+    store({100.0, 135.0, 100.0, 110.0, 110.0, 130.0});
+    child(3)->setName(nullptr, standin::tests::text(u"three").get(), 0);
+
+    ASSERT_TRUE(kept());
+    EXPECT_EQ(kept()->start(), 100.0);
+    EXPECT_EQ(kept()->end(), 135.0);
+    EXPECT_FALSE(kept()->framerate());
+    EXPECT_EQ(othersOf(*kept()), Names{"late"});
+
+    store({100.0});
+    EXPECT_FALSE(kept()->end());
+    EXPECT_EQ(othersOf(*kept()), (Names{"late", "one", "three"}));
+}
+
+TEST_F(PreviewRecordTest, IsNoneWhereTheNumbersMakeNoSense)
+{
+    EXPECT_FALSE(kept());
+    EXPECT_FALSE(PreviewRecord::isKeptBy(track));
+    for (const Numbers& numbers :
+         {Numbers{}, Numbers{1e9 + 1.0}, Numbers{-1e9 - 1.0}, Numbers{100.0, 99.0}, Numbers{100.0, 1.0, 25.0},
+          Numbers{100.0, 2.0, 25.0, 0.0, 130.0}, Numbers{100.0, 1.0, 25.0, 0.0, 130.0, 100.0, 130.0},
+          Numbers{100.0, 1.0, 25.0, 0.0, 99.0, 100.0, 110.0, 0.0, 7.0}}) {
+        SCOPED_TRACE(testing::PrintToString(numbers));
+        store(numbers);
+
+        EXPECT_TRUE(PreviewRecord::isKeptBy(track));
+        EXPECT_FALSE(kept());
+    }
+    for (const Numbers& numbers : {Numbers{1e9}, Numbers{-1e9}, Numbers{100.0, 100.0},
+                                   Numbers{100.0, 1.0, 25.0, 0.0, 99.0}, Numbers{100.0, 1.0, 25.0, 0.0, 100.0}}) {
+        SCOPED_TRACE(testing::PrintToString(numbers));
+        store(numbers);
+
+        EXPECT_TRUE(kept());
+    }
+    store({100.0, 1.0, 0.5, -3.0, 100.0});
+    EXPECT_FALSE(kept()->framerate());
+}
+
+TEST_F(PreviewRecordTest, IsDroppedWithItsAttribute)
+{
+    keep(record());
+
+    PreviewRecord::dropFrom(track);
+
+    EXPECT_FALSE(PreviewRecord::isKeptBy(track));
+    PreviewRecord::dropFrom(track);
+}
+
+TEST_F(PreviewRecordTest, EventsReachIntoAStretchWithoutItsEnd)
+{
+    struct Case {
+        double start;
+        double end;
+        Names names;
+    };
+    for (const Case& at : {Case{0.0, 1000.0, {"film", "late"}}, Case{10.0, 95.0, {}}, Case{9.96, 95.0, {"film"}},
+                           Case{10.0, 95.04, {"late"}}, Case{120.0, 130.0, {}}, Case{0.0, 0.04, {"film"}}}) {
+        SCOPED_TRACE(at.start);
+        Names names;
+        for (const auto& event : eventsReachingInto(track, at.start, at.end))
+            names.push_back(ConstString(event->getName()).text8());
+        EXPECT_EQ(names, at.names);
+    }
+}
+
+} // namespace cadrel::host
