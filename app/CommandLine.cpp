@@ -197,9 +197,6 @@ void addStrict(CLI::App& command, LoadOptions& load)
 void addLoadOptions(CLI::App& command, LoadOptions& load)
 {
     addRate(command, load, "Frame rate of the project; else the one that the first file shows");
-    command.add_flag_callback(
-        "--no-b-roll", [&load] { load.renameBRolls = false; },
-        "Keep A001B and A001 apart, instead of taking the first for a B-roll of the second");
     addStrict(command, load);
 }
 
@@ -433,6 +430,9 @@ CLI::App* addList(CLI::App& program, ListOptions& options)
     list->add_flag("--audio", options.load.acceptAudio, "Accept audio events, as for a change EDL");
     list->add_flag("--summary", options.summary, "Print the totals alone");
     addJson(*list, options.jsonFile, options.isReplacing, EventsJsonHelp);
+    list->add_flag_callback(
+        "--no-b-roll", [&options] { options.load.renameBRolls = false; },
+        "Keep A001B and A001 apart, instead of taking the first for a B-roll of the second");
     addShift(*list, options.shifts);
     addLoadOptions(*list, options.load);
     list->footer(ListHelp);

@@ -197,7 +197,8 @@ SoundDocument soundOf(const ApplyFacts& facts, const ProjectClock& clock, const 
 } // namespace
 
 ApplyNotes::ApplyNotes(const ApplyFacts& facts, const ProjectClock& clock, const NotesLayout& layout)
-    : m_notes(facts.model.oldEdl(), facts.model.newEdl(),
+    : m_settings(settingsOfNotes(*facts.settings, layout)),
+      m_notes(facts.model.oldEdl(), facts.model.newEdl(),
               pictureRules(facts.model.settings(), core::Timecode::framerate()), layout.simplify),
       m_soundNotes(m_notes, SoundGathering(facts, m_notes).takeFacts()),
       m_sound(soundOf(facts, clock, m_notes, m_soundNotes)), m_document{m_notes,
@@ -207,6 +208,7 @@ ApplyNotes::ApplyNotes(const ApplyFacts& facts, const ProjectClock& clock, const
                                                                         *facts.cuts,
                                                                         clock.rateLabel(),
                                                                         facts.model.settings().matchBy(),
+                                                                        m_settings,
                                                                         layout,
                                                                         &m_sound}
 {

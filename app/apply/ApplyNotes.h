@@ -19,6 +19,7 @@ public:
     const NotesDocument& document() const { return m_document; }
 
 private:
+    const SettingsReport m_settings;
     const core::ChangeNotes m_notes;
     const core::SoundNotes m_soundNotes;
     const SoundDocument m_sound;

@@ -41,7 +41,7 @@ constexpr std::size_t MostLinesTold = 10;
 constexpr std::size_t FewestTimecodesForALowerRate = 200;
 
 /// The nominal rates that timecodes show.
-constexpr std::array<std::int32_t, 4> NominalRates{24, 25, 30, 60};
+constexpr std::array<std::int32_t, 6> NominalRates{24, 25, 30, 48, 50, 60};
 
 /// The line that an event was read from.
 SourceLine lineOf(const EventBase& event)
@@ -78,14 +78,38 @@ Framerate EdlLoader::chooseRate(const std::string& firstFile) const
     parser->readThoroughly();
     if (parser->detect(path, shown) != Result::Ok)
         throw unreadable(firstFile);
-    if (const auto framerate = ProjectFramerate::fromShownRate(shown))
+    if (const auto framerate = ProjectFramerate::fromShownRate(shown)) {
+        warnOfLikeRates(firstFile, *framerate);
         return *framerate;
+    }
     // A file without anything readable needs different advice. At 60 frames a second every timecode can be read.
     const ProjectFramerate anyRate(Framerate(60, 0));
     LoadedEdl edl{firstFile, core::EventList(), {}, {}, {}};
     load(edl);
     refuseUnreadable(edl);
     throw Failure{firstFile, "shows no frame rate", "give it with --rate, such as --rate \"24 fps\""};
+}
+
+void EdlLoader::warnOfLikeRates(const std::string& file, const Framerate& judged) const
+{
+    // A list that fits 24, 25 or 30 fps is read at that.
+    if (judged.framesPerSecond != NominalRates.back())
+        return;
+    const ProjectFramerate framerate(judged);
+    LoadedEdl edl{file, core::EventList(), {}, {}, {}};
+    load(edl);
+    std::vector<std::string> labels;
+    for (const std::int32_t rate : NominalRates) {
+        if (edl.remarks.highestFrame < rate && rate < judged.framesPerSecond)
+            labels.push_back(ProjectFramerate::labelOf({rate, 0}));
+    }
+    if (labels.empty() || edl.remarks.timecodeCount >= FewestTimecodesForALowerRate)
+        return;
+    tell({file,
+          "is read at " + ProjectFramerate::labelOf(judged) + ", but has no frame number above " +
+              std::to_string(edl.remarks.highestFrame) + ", so that it may be of " + labels.front() +
+              (labels.size() > 1 ? " or " + labels.back() : ""),
+          "give the right one with --rate, such as --rate \"" + labels.front() + "\""});
 }
 
 std::list<LoadedEdl> EdlLoader::load(const std::vector<std::string>& files) const

@@ -60,6 +60,8 @@ private:
     void load(LoadedEdl& edl) const;
     void tellUnread(const LoadedEdl& edl) const;
     void checkRate(const LoadedEdl& edl) const;
+    /// Warns where a few timecodes alone show the highest rate and all of them exist at a lower one, too.
+    void warnOfLikeRates(const std::string& file, const core::Framerate& judged) const;
     void checkLowerRate(const LoadedEdl& edl) const;
     void checkDropFrame(const LoadedEdl& edl) const;
     void tell(const Failure& failure) const;

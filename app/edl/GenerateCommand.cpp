@@ -12,6 +12,7 @@
 #include "app/edl/EventJson.h"
 #include "app/edl/GenerationReport.h"
 #include "app/edl/ProjectFramerate.h"
+#include "app/settings/SettingsReport.h"
 #include "core/fileio/CmxWriter.h"
 #include "core/model/DataModel.h"
 #include "core/time/Timecode.h"
@@ -144,11 +145,12 @@ std::string writtenText(const GenerateOptions& options, const Files& files)
            line("Left over   ", files.leftOver, ", which may be of an earlier list; remove what you don't need");
 }
 
-void writeJson(Output& output, const DataModel& model, const GenerationReport& report, const std::string& rate,
-               const Files& files)
+void writeJson(Output& output, const DataModel& model, const GenerationReport& report, const SettingsReport& settings,
+               const std::string& rate, const Files& files)
 {
     ordered_json facts{{"rate", rate}};
     facts.update(report.toJson());
+    facts["settings"] = settings.toJson();
     facts["written"] = files.change;
     facts["backups"] = files.backups;
     facts["leftOver"] = files.leftOver;
@@ -172,6 +174,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     const Cuts cuts = generateChangeEdl(model, options.generation, terminal);
     requireChangeEvents(model, options.generation);
     const GenerationReport report(model, model.changeEdl(), cuts, framerate.getFramerate());
+    const SettingsReport settings = SettingsReport::ofCuts(model.settings(), options.generation.settings);
     Files files{filesOf(options.changeFile, model.changeEdl().size()), {}, {}};
     checkOutputs(options, files.change);
     requireReplaceable(files.change, options.replacing);
@@ -191,7 +194,7 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     std::optional<Output> json;
     if (Output::isFile(options.jsonFile)) {
         json.emplace(options.jsonFile, options.replacing.isAllowed);
-        writeJson(*json, model, report, rate, files);
+        writeJson(*json, model, report, settings, rate, files);
         json->finish();
     }
     if (!options.changeFile.empty())
@@ -204,13 +207,13 @@ void runGenerate(const GenerateOptions& options, Terminal& terminal)
     terminal.clearProgress();
     if (Output::isStandardOutput(options.jsonFile)) {
         Output output(options.jsonFile, true);
-        writeJson(output, model, report, rate, files);
+        writeJson(output, model, report, settings, rate, files);
         output.place();
         return;
     }
     const char* const origin = options.generation.load.rateLabel.empty() ? ", as the old cut shows" : "";
-    std::cout << report.cutsText(rate + origin) << report.changeText() << report.insertsText()
-              << writtenText(options, files);
+    std::cout << report.cutsText(rate + origin) << report.changeText() << settings.text("Settings    ")
+              << report.insertsText() << writtenText(options, files);
     flushStandardOutput();
 }
 

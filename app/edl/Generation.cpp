@@ -199,6 +199,7 @@ ReadFiles loadEvents(const EdlLoader& loader, const std::vector<std::string>& fi
 Cuts loadCuts(DataModel& model, const GenerationOptions& options, Terminal& terminal)
 {
     LoadOptions load = options.load;
+    load.renameBRolls = model.settings().bRollRenaming();
     load.shifts = FileShifts(options.shifts, inputsOf(options));
     ReadFiles oldFiles = loadCut(options.oldFiles, model.oldEdl(), load, terminal);
     ReadFiles newFiles = loadCut(options.newFiles, model.newEdl(), load, terminal);

@@ -10,6 +10,7 @@
 #include "app/edl/ProjectFramerate.h"
 #include "app/notes/NotesForms.h"
 #include "app/notes/NotesText.h"
+#include "app/settings/SettingsReport.h"
 #include "core/model/DataModel.h"
 #include "core/notes/ChangeNotes.h"
 #include "util/Result.h"
@@ -41,6 +42,8 @@ void runNotes(const NotesOptions& options, Terminal& terminal)
                             options.layout.simplify);
     // Only what was healed is told of it. The notes themselves leave no event out.
     model.generateChangeEdl([](const core::GenerationFailure&) { return core::FailureAnswer::PassOver; });
+    const SettingsReport settings =
+        settingsOfNotes(SettingsReport::ofCuts(model.settings(), options.generation.settings), options.layout);
     const NotesDocument document{notes,
                                  model.oldEdl(),
                                  model.newEdl(),
@@ -48,6 +51,7 @@ void runNotes(const NotesOptions& options, Terminal& terminal)
                                  cuts,
                                  ProjectFramerate::labelOf(framerate.getFramerate()),
                                  model.settings().matchBy(),
+                                 settings,
                                  options.layout};
 
     terminal.showProgress("writing");

@@ -14,6 +14,8 @@
 
 namespace cadrel::app {
 
+class SettingsReport;
+
 /// How notes are laid out.
 struct NotesLayout {
     std::int32_t simplify = 0; ///< frames within which trims are joined
@@ -50,6 +52,7 @@ struct NotesDocument {
     Cuts cuts;
     std::string rate; ///< its label
     std::int32_t matchBy;
+    const SettingsReport& settings;
     NotesLayout layout;
     const SoundDocument* sound = nullptr; ///< null where it is only about the picture
 };

@@ -5,6 +5,7 @@
 #include "app/console/Failure.h"
 #include "app/notes/NotesHtml.h"
 #include "app/notes/NotesPdf.h"
+#include "app/settings/SettingsReport.h"
 #include "core/settings/Settings.h"
 
 #include <algorithm>
@@ -43,6 +44,14 @@ core::PictureRules pictureRules(const core::Settings& settings, const core::Fram
     core::PictureRules rules{framerate, settings.matchBy(), {}};
     rules.versions.compileEnabled(settings.vfxPatterns());
     return rules;
+}
+
+SettingsReport settingsOfNotes(SettingsReport settings, const NotesLayout& layout)
+{
+    using Origin = SettingsReport::Origin;
+    settings.add({"simplify", "--simplify " + std::to_string(layout.simplify), layout.simplify,
+                  layout.simplify == 0 ? Origin::Default : Origin::CommandLine});
+    return settings;
 }
 
 } // namespace cadrel::app

@@ -21,4 +21,7 @@ NotesWriter notesWriterFor(const std::string& option, const std::string& file);
 /// How the notes of a run with these settings compare the cuts.
 core::PictureRules pictureRules(const core::Settings& settings, const core::Framerate& framerate);
 
+/// The settings, and what of the layout changes the steps.
+SettingsReport settingsOfNotes(SettingsReport settings, const NotesLayout& layout);
+
 } // namespace cadrel::app

@@ -4,6 +4,7 @@
 #include "app/notes/NotesText.h"
 #include "app/notes/NotesWording.h"
 #include "app/notes/SoundWording.h"
+#include "app/settings/SettingsReport.h"
 #include "core/edl/EventBase.h"
 
 #include <nlohmann/json.hpp>
@@ -118,6 +119,7 @@ public:
         add("rate", m_document.rate);
         add("match", m_document.matchBy == core::MatchBy::ClipName ? "clip" : "roll");
         add("simplifyFrames", m_document.layout.simplify);
+        add("settings", m_document.settings.toJson());
         add("totals", totalsJson());
         add("healed", {{"events", m_document.healing.events},
                        {"members", m_document.healing.members},

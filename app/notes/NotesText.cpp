@@ -6,6 +6,7 @@
 #include "app/console/Wording.h"
 #include "app/notes/NotesWording.h"
 #include "app/notes/SoundWording.h"
+#include "app/settings/SettingsReport.h"
 
 #include <algorithm>
 
@@ -96,7 +97,7 @@ private:
     std::string cuts() const
     {
         return line("Old cut", m_words.cutText(false)) + line("New cut", m_words.cutText(true)) +
-               line("Frame rate", m_document.rate);
+               line("Frame rate", m_document.rate) + m_document.settings.text(padded("Settings", 12), Width);
     }
 
     std::string figures() const

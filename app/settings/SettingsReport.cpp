@@ -21,8 +21,6 @@ using Origin = SettingsReport::Origin;
 
 namespace {
 
-constexpr std::size_t LongestLine = 120;
-
 /// In the order of Origin.
 constexpr std::array<const char*, 3> OriginWords{"command line", "project", "default"};
 
@@ -125,6 +123,18 @@ struct Reader {
     }
 };
 
+/// Those of a setting that has several, such as "--vfx A,B --vfx C,D".
+std::vector<std::string> singleOptions(const std::string& text)
+{
+    std::vector<std::string> options;
+    for (std::size_t start = 0; start < text.size();) {
+        const std::size_t end = std::min(text.find(" --", start), text.size());
+        options.push_back(text.substr(start, end - start));
+        start = end + 1;
+    }
+    return options;
+}
+
 const char* wordOf(Origin origin)
 {
     return OriginWords[static_cast<std::size_t>(origin)];
@@ -138,13 +148,29 @@ SettingsReport::SettingsReport(const Settings& settings, const GivenSettings& gi
     for (const SettingEntry& entry : settingsTable()) {
         if (entry.use == SettingEntry::Use::Generation && !isGenerated)
             continue;
-        const Reading reading = std::visit(Reader{settings, timeText, entry.name}, entry.kind);
-        const Origin own = reading.isUsual ? Origin::Default : Origin::Project;
-        m_lines.push_back({entry.name, reading.option, reading.value, given.has(entry) ? Origin::CommandLine : own});
+        add(entry, settings, given, Origin::Project, timeText);
     }
 }
 
-std::string SettingsReport::text(const std::string& title) const
+SettingsReport SettingsReport::ofCuts(const Settings& settings, const GivenSettings& given)
+{
+    SettingsReport report;
+    for (const SettingEntry& entry : settingsTable()) {
+        if (entry.use != SettingEntry::Use::Run)
+            report.add(entry, settings, given, Origin::CommandLine, {});
+    }
+    return report;
+}
+
+void SettingsReport::add(const SettingEntry& entry, const Settings& settings, const GivenSettings& given, Origin own,
+                         const TimeText& timeText)
+{
+    const Reading reading = std::visit(Reader{settings, timeText, entry.name}, entry.kind);
+    const Origin found = reading.isUsual ? Origin::Default : own;
+    m_lines.push_back({entry.name, reading.option, reading.value, given.has(entry) ? Origin::CommandLine : found});
+}
+
+std::string SettingsReport::text(const std::string& title, std::size_t width) const
 {
     constexpr std::size_t WordColumn = 14;
     std::string text;
@@ -153,18 +179,19 @@ std::string SettingsReport::text(const std::string& title) const
         for (const Line& setting : m_lines) {
             if (setting.origin != origin || setting.option.empty())
                 continue;
-            const std::string option = toPrintable(setting.option).text;
-            if (line.empty()) {
-                line = text.empty() ? title : std::string(title.size(), ' ');
-                line += wordOf(origin);
-                line.resize(title.size() + WordColumn, ' ');
-            } else if (line.size() + 1 + option.size() > LongestLine) {
-                text += line + "\n";
-                line = std::string(title.size() + WordColumn, ' ');
-            } else {
-                line += ' ';
+            for (const std::string& option : singleOptions(toPrintable(setting.option).text)) {
+                if (line.empty()) {
+                    line = text.empty() ? title : std::string(title.size(), ' ');
+                    line += wordOf(origin);
+                    line.resize(title.size() + WordColumn, ' ');
+                } else if (line.size() + 1 + option.size() > width) {
+                    text += line + "\n";
+                    line = std::string(title.size() + WordColumn, ' ');
+                } else {
+                    line += ' ';
+                }
+                line += option;
             }
-            line += option;
         }
         if (!line.empty())
             text += line + "\n";

@@ -4,6 +4,7 @@
 
 #include "app/settings/SettingsTable.h"
 
+#include <cstddef>
 #include <functional>
 #include <nlohmann/json.hpp>
 #include <string>
@@ -31,16 +32,24 @@ public:
     /// project's where it isn't the default and wasn't given.
     SettingsReport(const core::Settings& settings, const GivenSettings& given, bool isGenerated,
                    const TimeText& timeText);
+    /// The settings of what is made of two cuts without a project. Those that are for a run alone aren't among them.
+    static SettingsReport ofCuts(const core::Settings& settings, const GivenSettings& given);
 
     /// A choice that isn't one of the settings, after them.
     void add(Line line) { m_lines.push_back(std::move(line)); }
 
-    /// Lines of a title, such as "Settings    ", and the options that give these values, by where they are from.
-    std::string text(const std::string& title) const;
+    /// Lines of a title, such as "Settings    ", and the options that give these values, by where they are from. A line is
+    /// wider only where a single option is.
+    std::string text(const std::string& title, std::size_t width = 120) const;
     /// {"tracks": {"value": "all", "from": "default"}, ...}.
     nlohmann::ordered_json toJson() const;
 
 private:
+    SettingsReport() = default;
+    /// `own` is where a value is from that isn't the default and isn't among those given.
+    void add(const SettingEntry& entry, const core::Settings& settings, const GivenSettings& given, Origin own,
+             const TimeText& timeText);
+
     std::vector<Line> m_lines;
 };
 

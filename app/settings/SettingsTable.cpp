@@ -57,7 +57,8 @@ const std::array Table{
                  "Mark slivers of clips at the ends of stretches"},
     SettingEntry{"overlap-markers", Use::Run, SwitchSetting{&Settings::createOverlapMarkers},
                  "Mark stretches that want the same place of a track"},
-    SettingEntry{"b-roll", Use::Run, SwitchSetting{&Settings::bRollRenaming}, "Take A001B for a B-roll of A001"},
+    SettingEntry{"b-roll", Use::RunAndGeneration, SwitchSetting{&Settings::bRollRenaming},
+                 "Take A001B for a B-roll of A001"},
 };
 
 } // namespace

@@ -182,6 +182,24 @@ TEST(ApplyNotes, TheJsonHasTheTimesOfEachChange)
     EXPECT_EQ(step.at("changes")[1].at("kind"), "fell-out");
 }
 
+TEST(ApplyNotes, TellTheSettingsOfTheRun)
+{
+    const Sound sound;
+    const std::string file = sound.folder / "notes.json";
+    const Outcome outcome =
+        sound.apply({"--notes", file, "--simplify", "2", "--overhang", "6", "--no-b-roll", "--json", "-"});
+
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+    json expected = json::parse(outcome.out).at("settings");
+    EXPECT_EQ(expected.at("overhang"), json::parse(R"({"value": 6, "from": "command line"})"));
+    expected["simplify"] = {{"value", 2}, {"from", "command line"}};
+    EXPECT_EQ(json::parse(contentOf(file)).at("settings"), expected);
+    EXPECT_TRUE(tells(sound.notes(".txt", {"--overhang", "6", "--no-b-roll"}),
+                      "\nFrame rate  24 fps\nSettings    command line  --overhang 6 --no-b-roll\n"
+                      "            default       --tracks all --match roll --heal normal --vfx none\n"));
+    EXPECT_FALSE(tells(sound.notes(".csv", {"--overhang", "6"}), "overhang"));
+}
+
 TEST(ApplyNotes, TheJsonKeepsToItsSchema)
 {
     const JsonSchema schema("notes");
@@ -678,6 +696,9 @@ TEST(ApplyNotesOfTheExample, HaveTheStepsOfTheNotesWithoutSound)
     // The list that is carried out begins with the first change.
     expected.erase("healed");
     notes.erase("healed");
+    // A run has settings of its own.
+    expected.erase("settings");
+    notes.erase("settings");
     EXPECT_EQ(notes, expected);
 }
 

@@ -476,6 +476,38 @@ TEST(Apply, EventsAreToldThatArePassedOver)
     EXPECT_TRUE(tells(outcome.err, "check the file and the frame rate of the project\n")) << outcome.err;
 }
 
+TEST(Apply, OfManyEventsThatArePassedOverTenAreListedAndTheRestIsCounted)
+{
+    const Scene scene;
+    const auto reportWith = [&scene](int count, const Words& more = {}) {
+        std::string text = "TITLE: CHANGE\n" + cut("001", "A001", "01:00:00:00 01:00:10:00", "01:00:00:00 01:00:10:00");
+        // No frame has the number 30 at 24 fps.
+        for (int index = 0; index < count; ++index)
+            text +=
+                cut(std::to_string(101 + index).c_str(), "A002", "01:00:12:00 01:00:20:30", "01:00:10:00 01:00:18:00");
+        Words words{"apply", scene.project, "--change", scene.folder.write("change.edl", text), "--summary"};
+        words.insert(words.end(), more.begin(), more.end());
+        const Outcome outcome = runCadrel(words);
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return outcome.out;
+    };
+    const auto listOf = [](int first, int last) {
+        std::string lines;
+        for (int number = first; number <= last; ++number)
+            lines += "            " + std::to_string(number) +
+                     "  01:00:10:00  01:00:18:00  A002: has a timecode that doesn't exist at 24 fps\n";
+        return lines;
+    };
+
+    EXPECT_TRUE(tells(reportWith(9), "Passed over 9 events\n" + listOf(101, 109) + "Clips "));
+    EXPECT_TRUE(tells(reportWith(10), "Passed over 10 events\n" + listOf(101, 110) + "Clips "));
+    EXPECT_TRUE(tells(reportWith(11), "Passed over 11 events\n" + listOf(101, 110) +
+                                          "            and 1 more; --json lists them all\nClips "));
+    EXPECT_TRUE(tells(reportWith(200), "Passed over 200 events\n" + listOf(101, 110) +
+                                           "            and 190 more; --json lists them all\nClips "));
+    EXPECT_EQ(json::parse(reportWith(200, {"--json", "-"})).at("passedOver").size(), 200U);
+}
+
 TEST(Apply, WhereStretchesOverlapTheLastOneHolds)
 {
     for (const Origin origin : Origins) {

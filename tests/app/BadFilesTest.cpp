@@ -3,6 +3,7 @@
 #include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/SoundProject.h"
+#include "tests/app/WithoutSecondNames.h"
 #include "tests/support/Sanitizer.h"
 #include "tests/support/TreePaths.h"
 
@@ -563,6 +564,125 @@ TEST(BadOutput, ABackupKeepsTheFormerJsonFileToo)
         EXPECT_NE(outcome.out.find("Backup      " + backup + "\n"), std::string::npos) << outcome.out;
         std::filesystem::remove(backup);
     }
+}
+
+/// A copy of the small example project that is longer than a limit.
+std::string longProject(const TempFolder& folder, std::size_t limit)
+{
+    // Blanks after the end of the text mean nothing.
+    return folder.write("reel.stage",
+                        contentOf(treePath("examples/tworeels/tworeels.stage")) + std::string(limit, ' ') + "\n");
+}
+
+ino_t inodeOf(const std::string& file)
+{
+    struct stat facts {};
+    EXPECT_EQ(stat(file.c_str(), &facts), 0) << file;
+    return facts.st_ino;
+}
+
+TEST(BadOutput, ABackupIsACopyWhereFilesCantHaveSecondNames)
+{
+    const TempFolder folder;
+    const std::string oldFile = treePath("examples/tworeels/old.edl");
+    const std::string newFile = treePath("examples/tworeels/new.edl");
+    const std::string project = longProject(folder, 100000);
+    const std::string before = contentOf(project);
+    const ino_t inode = inodeOf(project);
+    const std::string document = folder.write("a.json", "former");
+
+    const Outcome outcome = runCadrelWithoutSecondNames({"apply", project, "--old", oldFile, "--new", newFile,
+                                                         "--in-place", "--json", document, "--overwrite", "--backup"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(contentOf(folder / "reel_backup_1.stage"), before);
+    EXPECT_NE(contentOf(project), before);
+    EXPECT_EQ(contentOf(folder / "a_backup_1.json"), "former");
+    EXPECT_TRUE(json::parse(contentOf(document)).is_object());
+    EXPECT_EQ(folder.names(),
+              (std::vector<std::string>{"a.json", "a_backup_1.json", "reel.stage", "reel_backup_1.stage"}));
+    EXPECT_NE(inodeOf(folder / "reel_backup_1.stage"), inode);
+}
+
+TEST(BadOutput, ABackupThatIsACopyTakesTheNextFreeNumber)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const std::string change = folder.write("change.edl", "former");
+    folder.write("change_backup_1.edl", "older");
+
+    const Outcome outcome = runCadrelWithoutSecondNames(
+        {"generate", "--old", oldFile, "--new", newFile, "-o", change, "--overwrite", "--backup"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(contentOf(folder / "change_backup_1.edl"), "older");
+    EXPECT_EQ(contentOf(folder / "change_backup_2.edl"), "former");
+    EXPECT_NE(contentOf(change), "former");
+}
+
+TEST(BadOutput, ABackupThatCantBeCopiedWholeStopsTheRunAndLeavesEveryFileAsItWas)
+{
+    constexpr std::size_t Limit = 100000;
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const std::string project = longProject(folder, Limit);
+    const std::string before = contentOf(project);
+    const std::string longText(Limit + 1, 'f');
+    const std::string shortFile = folder.write("short.txt", "former");
+    const std::string longFile = folder.write("long.txt", longText);
+    const std::string document = folder.write("long.json", longText);
+    const std::vector<std::string> names = folder.names();
+    const auto run = [&](std::vector<std::string> words) {
+        words.insert(words.end(), {"--overwrite", "--backup"});
+        return runCadrelWithoutSecondNames(words, Limit);
+    };
+    const std::string full = ": can't be written; see whether the disk is full, or give another name";
+    const std::string projectBackup = folder / "reel_backup_1.stage";
+    const std::string documentBackup = folder / "long_backup_1.json";
+
+    expectStopped(run({"notes", "--old", oldFile, "--new", newFile, "-o", longFile}),
+                  (folder / "long_backup_1.txt").string() + full);
+    // The backup of the first file is whole then, and goes too.
+    expectStopped(run({"generate", "--old", oldFile, "--new", newFile, "-o", shortFile, "--json", document}),
+                  documentBackup + full);
+    expectStopped(run({"apply", project, "--old", treePath("examples/tworeels/old.edl"), "--new",
+                       treePath("examples/tworeels/new.edl"), "--in-place"}),
+                  projectBackup + full);
+    const std::string exact = folder.write("exact.txt", std::string(Limit, 'f'));
+    const Outcome whole = run({"notes", "--old", oldFile, "--new", newFile, "-o", exact});
+
+    EXPECT_EQ(contentOf(longFile), longText);
+    EXPECT_EQ(contentOf(shortFile), "former");
+    EXPECT_EQ(contentOf(document), longText);
+    EXPECT_EQ(contentOf(project), before);
+    EXPECT_EQ(whole.status, 0) << whole.err;
+    EXPECT_EQ(contentOf(folder / "exact_backup_1.txt"), std::string(Limit, 'f'));
+    std::filesystem::remove(folder / "exact_backup_1.txt");
+    std::filesystem::remove(exact);
+    EXPECT_EQ(folder.names(), names);
+}
+
+TEST(BadOutput, ABackupOfTheProjectGoesWhereThatOfItsReportCantBeCopied)
+{
+    const TempFolder folder;
+    const std::string text = contentOf(treePath("examples/tworeels/tworeels.stage"));
+    const std::string project = folder.write("reel.stage", text);
+    const std::size_t limit = 1000000;
+    ASSERT_LT(text.size(), limit);
+    const std::string document = folder.write("a.json", std::string(limit + 1, 'f'));
+
+    const Outcome outcome = runCadrelWithoutSecondNames(
+        {"apply", project, "--old", treePath("examples/tworeels/old.edl"), "--new",
+         treePath("examples/tworeels/new.edl"), "--in-place", "--json", document, "--overwrite", "--backup"},
+        limit);
+
+    expectStopped(outcome, (folder / "a_backup_1.json").string() +
+                               ": can't be written; see whether the disk is full, or give another name");
+    EXPECT_EQ(contentOf(project), text);
+    EXPECT_EQ(contentOf(document), std::string(limit + 1, 'f'));
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"a.json", "reel.stage"}));
 }
 
 TEST(BadOutput, DevicesAreWrittenAndStay)

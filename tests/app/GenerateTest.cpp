@@ -80,6 +80,7 @@ TEST(Generate, PrintsASummary)
                            "Frame rate  24 fps, as the old cut shows\n"
                            "Change EDL  3 events\n"
                            "Covered     00:00:28:00 of 00:00:32:00, 87.5 %\n"
+                           "Settings    default       --match roll --heal normal --vfx none --b-roll\n"
                            "Inserts     1, together 00:00:04:00\n"
                            "\n"
                            "            in           out          length       shot\n"
@@ -87,6 +88,30 @@ TEST(Generate, PrintsASummary)
                            "\n"
                            "Written     " +
                                (film.folder / "change.edl").string() + "\n");
+}
+
+TEST(Generate, TheSettingsInForceAreToldWithWhereTheyAreFrom)
+{
+    const Film film(oldCut(), newCut());
+    const auto settingsOf = [&film](const std::vector<std::string>& options) {
+        const Outcome outcome = film.generate(options);
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        const std::size_t start = outcome.out.find("Settings    ");
+        return outcome.out.substr(start, outcome.out.find("Inserts") - start);
+    };
+
+    EXPECT_EQ(settingsOf({"--match", "clip", "--vfx", "VFX_****_v,_comp", "--vfx", "A,B", "--no-b-roll"}),
+              "Settings    command line  --match clip --vfx 'VFX_****_v,_comp' --vfx A,B --no-b-roll\n"
+              "            default       --heal normal\n");
+    // What is given is from the command line, though it is the default.
+    EXPECT_EQ(settingsOf({"--heal", "normal", "--b-roll", "--vfx", "none"}),
+              "Settings    command line  --heal normal --vfx none --b-roll\n"
+              "            default       --match roll\n");
+    EXPECT_EQ(film.generateAsJson({"--heal", "gaps", "--vfx", "A,B", "--no-b-roll"}).at("settings"), json::parse(R"({
+        "match": {"value": "roll", "from": "default"},
+        "heal": {"value": "gaps", "from": "command line"},
+        "vfx": {"value": ["A,B"], "from": "command line"},
+        "b-roll": {"value": false, "from": "command line"}})"));
 }
 
 TEST(Generate, AnInsertThatIsHealedOverStaysAnInsert)

@@ -142,6 +142,46 @@ TEST(Notes, LongNamesMakeNoLineWider)
     }
 }
 
+TEST(Notes, TheSettingsInForceStandInTheTextAndTheJsonAlone)
+{
+    const Cuts film(oldCut(), newCut());
+    const std::string page = film.folder / "notes.json";
+    const std::string table = film.folder / "notes.csv";
+
+    const Outcome text = film.notes({"--heal", "gaps", "--vfx", "VFX_****_v,_comp", "--no-b-roll"});
+    EXPECT_EQ(film.notes({"--simplify", "12", "-o", page}).status, 0);
+    EXPECT_EQ(film.notes({"--heal", "gaps", "-o", table}).status, 0);
+
+    EXPECT_NE(text.out.find("\nFrame rate  24 fps\n"
+                            "Settings    command line  --heal gaps --vfx 'VFX_****_v,_comp' --no-b-roll\n"
+                            "            default       --match roll --simplify 0\n"
+                            "Length      "),
+              std::string::npos)
+        << text.out;
+    EXPECT_EQ(json::parse(contentOf(page)).at("settings"), json::parse(R"({
+        "match": {"value": "roll", "from": "default"},
+        "heal": {"value": "normal", "from": "default"},
+        "vfx": {"value": [], "from": "default"},
+        "b-roll": {"value": true, "from": "default"},
+        "simplify": {"value": 12, "from": "command line"}})"));
+    EXPECT_EQ(contentOf(table).find("heal"), std::string::npos);
+}
+
+TEST(Notes, ManySettingsMakeNoLineWiderThan80Columns)
+{
+    const Cuts film(oldCut(), newCut());
+
+    const Outcome outcome = film.notes({"--match", "clip", "--heal", "inserts", "--vfx", "VFX_****_v,_comp", "--vfx",
+                                        "SHOT_****_v,_x", "--no-b-roll", "--simplify", "10000"});
+
+    EXPECT_NE(outcome.out.find("Settings    command line  --match clip --heal inserts --vfx 'VFX_****_v,_comp'\n"
+                               "                          --vfx 'SHOT_****_v,_x' --no-b-roll --simplify 10000\n"),
+              std::string::npos)
+        << outcome.out;
+    for (const std::string& line : linesOf(outcome.out))
+        EXPECT_LE(columnsOf(line), 80) << line;
+}
+
 TEST(Notes, FeetCountTheLastFrameIn)
 {
     const Cuts film(oldCut(), newCut());

@@ -83,7 +83,15 @@ TEST(Rates, AListOfALowerRateIsWarnedOfFrom200TimecodesOn)
               "shows 25 fps in all of its 200 timecodes, less than the 29.97 dfps of the project" + Check);
     EXPECT_EQ(warningsOf(manyTimecodes(200, "29"), "50 fps"),
               "shows 30 fps in all of its 200 timecodes, less than the 50 fps of the project" + Check);
-    EXPECT_EQ(warningsOf(manyTimecodes(400, "30"), "60 fps"), "");
+    EXPECT_EQ(warningsOf(manyTimecodes(200, "30"), "60 fps"),
+              "shows 48 fps in all of its 200 timecodes, less than the 60 fps of the project" + Check);
+    EXPECT_EQ(warningsOf(manyTimecodes(200, "47"), "50 fps"),
+              "shows 48 fps in all of its 200 timecodes, less than the 50 fps of the project" + Check);
+    EXPECT_EQ(warningsOf(manyTimecodes(200, "48"), "50 fps"), "");
+    EXPECT_EQ(warningsOf(manyTimecodes(200, "49"), "60 fps"),
+              "shows 50 fps in all of its 200 timecodes, less than the 60 fps of the project" + Check);
+    EXPECT_EQ(warningsOf(manyTimecodes(400, "50"), "60 fps"), "");
+    EXPECT_EQ(warningsOf(manyTimecodes(400, "47"), "47.95 fps"), "");
     EXPECT_EQ(warningsOf(manyTimecodes(400, "29"), "29.97 fps"), "");
 }
 
@@ -95,6 +103,78 @@ TEST(Rates, AListThatFitsAHighRateIsNotTakenForAHigherOne)
               "shows 60 fps, more than the 48 fps of the project, first in line 1: "
               "\"001  A001  V  C  10:00:00:00 10:00:10:48 01:00:00:00 01:00:10:12\"" +
                   Check);
+}
+
+/// Without a rate that is given.
+Outcome listed(const TempFolder& folder, const std::string& text, std::vector<std::string> more = {})
+{
+    more.insert(more.begin(), {"list", folder.write("film.edl", text), "--summary"});
+    return runCadrel(more);
+}
+
+TEST(Rates, AListThatIsReadAt60FpsButMayBeOf48Or50FpsIsWarnedOf)
+{
+    const TempFolder folder;
+    const std::string front = "cadrel: " + (folder / "film.edl").string() + ": ";
+    const std::string remedy = "; give the right one with --rate, such as --rate \"";
+    const auto hint = [&](const std::string& frame, const std::string& rates, const std::string& example) {
+        return "is read at 60 fps, but has no frame number above " + frame + ", so that it may be of " + rates +
+               remedy + example + "\"\n";
+    };
+    const std::string anyOfThem = "48 fps or 50 fps";
+
+    EXPECT_EQ(listed(folder, manyTimecodes(8, "29")).err, "");
+    EXPECT_EQ(listed(folder, manyTimecodes(8, "30")).err, front + "warning: " + hint("30", anyOfThem, "48 fps"));
+    EXPECT_EQ(listed(folder, manyTimecodes(196, "47")).err, front + "warning: " + hint("47", anyOfThem, "48 fps"));
+    EXPECT_EQ(listed(folder, manyTimecodes(8, "48")).err, front + "warning: " + hint("48", "50 fps", "50 fps"));
+    EXPECT_EQ(listed(folder, manyTimecodes(8, "49")).err, front + "warning: " + hint("49", "50 fps", "50 fps"));
+    EXPECT_EQ(listed(folder, manyTimecodes(8, "50")).err, "");
+    EXPECT_EQ(listed(folder, manyTimecodes(8, "47"), {"--rate", "60"}).err, "");
+    EXPECT_EQ(listed(folder, manyTimecodes(8, "47"), {"--rate", "48"}).err, "");
+    EXPECT_NE(listed(folder, manyTimecodes(8, "47")).out.find("Frame rate  60 fps\n"), std::string::npos);
+    // Many timecodes tell the rate by themselves.
+    EXPECT_EQ(listed(folder, manyTimecodes(200, "47")).err,
+              front + "warning: shows 48 fps in all of its 200 timecodes, less than the 60 fps of the project" + Check);
+
+    const Outcome strict = listed(folder, manyTimecodes(8, "47"), {"--strict"});
+    EXPECT_EQ(strict.status, 1);
+    EXPECT_EQ(strict.err, front + hint("47", anyOfThem, "48 fps"));
+}
+
+TEST(Rates, EveryCommandThatJudgesARateWarnsOfItOnce)
+{
+    const TempFolder folder;
+    const std::string file = folder.write("film.edl", manyTimecodes(8, "40"));
+
+    for (const char* const command : {"generate", "notes"}) {
+        const Outcome outcome = runCadrel({command, "--old", file, "--new", file});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        EXPECT_EQ(outcome.err,
+                  "cadrel: " + file +
+                      ": warning: is read at 60 fps, but has no frame number above 40, so that it may be of "
+                      "48 fps or 50 fps; give the right one with --rate, such as --rate \"48 fps\"\n");
+    }
+}
+
+TEST(Rates, APulledDownRateChangesNothingInAChangeEdl)
+{
+    const TempFolder folder;
+    const std::string oldFile = folder.write("old.edl", oldCut());
+    const std::string newFile = folder.write("new.edl", newCut());
+    const auto changeAt = [&](const std::vector<std::string>& rate) {
+        std::vector<std::string> words{"generate", "--old", oldFile,          "--new",
+                                       newFile,    "-o",    folder / "c.edl", "--overwrite"};
+        words.insert(words.end(), rate.begin(), rate.end());
+        EXPECT_EQ(runCadrel(words).status, 0);
+        return contentOf(folder / "c.edl");
+    };
+
+    EXPECT_EQ(changeAt({"--rate", "23.98"}), changeAt({}));
+    EXPECT_EQ(changeAt({"--rate", "24.98"}), changeAt({"--rate", "25"}));
+    EXPECT_EQ(changeAt({"--rate", "29.97"}), changeAt({"--rate", "30"}));
+    EXPECT_EQ(changeAt({"--rate", "29.97 dfps"}), changeAt({"--rate", "30 dfps"}));
+    EXPECT_EQ(changeAt({"--rate", "47.95"}), changeAt({"--rate", "48"}));
+    EXPECT_EQ(changeAt({"--rate", "59.94"}), changeAt({"--rate", "60"}));
 }
 
 TEST(Rates, AChangeEdlOfADropFrameProjectReadsBackAsWhatItIs)

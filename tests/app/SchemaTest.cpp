@@ -113,7 +113,7 @@ std::vector<Pattern> patterns()
     const Documents documents;
     return {
         {"list", {documents.list()}, {"parts"}, {"kind", "transition", "flaws"}},
-        {"generate", {documents.generate()}, {"parts"}, {"kind", "transition", "flaws"}},
+        {"generate", {documents.generate()}, {"parts"}, {"kind", "transition", "flaws", "from"}},
         {"notes",
          documents.notes(),
          {"insertFrom", "from", "moveFrames", "oldShot", "newShot", "old", "new", "standsAt", "shots", "part", "feet"},

@@ -83,7 +83,7 @@ bool Sheet::isCoveredByAnother() const
     const auto& siblings = parent->getChildren();
     return std::any_of(siblings.begin(), siblings.end(), [this](const Component* sibling) {
         const auto* const other = dynamic_cast<const Sheet*>(sibling);
-        return other && other != this && other->m_isOver && other->m_beneath == m_beneath;
+        return other && other != this && other->m_isOver && other->m_beneath == m_beneath.getComponent();
     });
 }
 
