@@ -263,7 +263,7 @@ private:
         addText("The reels", HeadingFont, Ink, 24, true);
         const auto line = [this](const std::array<std::string, 6>& cells, const PdfFont& font,
                                  const PdfColour& colour) {
-            add(11.5, [this, cells, font, colour](PdfPages& pages, double top) {
+            add(11.5, [cells, font, colour](PdfPages& pages, double top) {
                 constexpr std::array Rights{24.0, 98.0, 172.0, 246.0, 324.0, 364.0};
                 for (std::size_t cell = 0; cell < cells.size(); ++cell)
                     pages.textToRight(Margin + Rights[cell], top + 8.5, cells[cell], font, colour);

@@ -94,6 +94,24 @@ TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidPastIt)
     EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "late 86420-86440", "later 87400-87410"}));
 }
 
+TEST_P(HostPreviewStretchTest, ARunLeavesWhatTheUserHasLaidThereWhetherThePreviewHasEndedOrNot)
+{
+    for (const bool hasEnded : {false, true}) {
+        SCOPED_TRACE(hasEnded);
+        previewAll();
+        const std::u16string name = hasEnded ? u"later" : u"late";
+        host.addSound(track, name.c_str(), Day + (hasEnded ? 1000.0 : 15.0), Day + (hasEnded ? 1010.0 : 40.0));
+        if (hasEnded)
+            adapter().setPreviewActive(false);
+
+        ASSERT_EQ(adapter().startCadrel(), Result::Ok);
+        host.idle();
+
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    }
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "late 86415-86440", "later 87400-87410"}));
+}
+
 TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidWithinIt)
 {
     previewAll();

@@ -187,7 +187,8 @@ public:
     /// written.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
-    /// What a run replaces.
+    /// What a run replaces, in seconds of the project's clock: the range that the user restricts it to, or else the day that
+    /// timecodes can name.
     void getApplyRange(double& start, double& end) const;
     /// Lets the host join the pieces that the cuts have left of one clip.
     void closeRange(bool onlySelected, double start, double end);

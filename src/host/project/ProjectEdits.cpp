@@ -327,7 +327,8 @@ void Project::getApplyRange(double& start, double& end) const
     const double offset = requiredOffset();
     const core::Settings& settings = m_model.settings();
     start = settings.restrictRange() ? settings.preserveMaterialBefore() : 0.0;
-    end = settings.restrictRange() ? settings.preserveMaterialAfter() : offset;
+    // The preview lies days later when something stands past the programme, which no timecode names.
+    end = settings.restrictRange() ? settings.preserveMaterialAfter() : std::min(offset, dayLength());
 }
 
 void Project::closeRange(bool onlySelected, double start, double end)
