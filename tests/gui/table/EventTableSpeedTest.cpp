@@ -96,8 +96,14 @@ TEST_F(EventTableSpeedTest, EachStepOfAHundredThousandRowsIsDoneInATenthOfASecon
     });
     m_dataModel.oldEdl().append(list());
     m_dataModel.newEdl().append(list());
-    expectFast("related events of one",
+    expectFast("related old events of one",
                [&] { EXPECT_EQ(m_dataModel.oldEventsBehind({list().eventAt(5000)}).size(), 1U); });
+    expectFast("related new events of one",
+               [&] { EXPECT_EQ(m_dataModel.newEventsBehind({list().eventAt(5000)}).size(), 1U); });
+    expectFast("related old events of all",
+               [&] { EXPECT_EQ(m_dataModel.oldEventsBehind(list().events()).size(), 100000U); });
+    expectFast("related new events of all",
+               [&] { EXPECT_EQ(m_dataModel.newEventsBehind(list().events()).size(), 100000U); });
     expectFast("store the selection",
                [&] { cadrel::gui::StoredTable(m_dataModel, 2).setSelection(m_model->getSelectedRows()); });
     expectFast("restore the selection",
