@@ -144,8 +144,10 @@ void EventList::healSelection(const EventList& selection, const EventList& refer
 }
 
 HealCheck::HealCheck(const EventList& list, const EventList& selection, const EventList& referenceList)
-    : m_list(list), m_selection(selection), m_referenceList(referenceList),
-      m_selected(selection, Timecode::framerate()), m_isFragmented(isFragmented(m_selected, list))
+    : m_referenceList(referenceList), m_selectedCount(selection.size()), m_selected(selection, Timecode::framerate()),
+      m_isFragmented(isFragmented(m_selected, list)),
+      m_collected(m_isFragmented ? EventList() : withoutHealing(list, m_selected)),
+      m_untimed(takeUntimed(m_collected).size())
 {
 }
 
@@ -153,12 +155,10 @@ bool HealCheck::canHeal(std::int32_t healMode) const
 {
     if (m_isFragmented)
         return false;
-    EventList collected = withoutHealing(m_list, m_selected);
-    const EventList untimed = takeUntimed(collected);
     Settings settings;
     settings.setHealMode(healMode);
-    const std::size_t timed = HealProcessing().countAfter(collected, makeContext(m_referenceList, settings));
-    return timed + untimed.size() != m_selection.size();
+    const std::size_t timed = HealProcessing().countAfter(m_collected, makeContext(m_referenceList, settings));
+    return timed + m_untimed != m_selectedCount;
 }
 
 bool EventList::canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const
