@@ -2,6 +2,7 @@
 
 // The edits of a change EDL that heal events and extend them.
 
+#include "core/change/HealCheck.h"
 #include "core/change/HealProcessing.h"
 #include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
@@ -12,8 +13,8 @@
 
 #include <algorithm>
 #include <functional>
-#include <set>
 #include <utility>
+#include <vector>
 
 namespace cadrel::core {
 
@@ -57,15 +58,23 @@ bool isFragmented(const CutMap& selected, const EventList& list)
     if (selected.dstInOrder().size() < 2)
         return false;
     const CutMap whole(list, Timecode::framerate());
-    using Neighbours = std::pair<std::shared_ptr<EventBase>, std::shared_ptr<EventBase>>;
+    using Neighbours = std::pair<const EventBase*, const EventBase*>;
     const auto neighboursOf = [](const CutMap& map) {
-        std::set<Neighbours> neighbours;
-        for (std::size_t index = 0; index + 1 < map.dstInOrder().size(); ++index)
-            neighbours.emplace(map.dstInOrder()[index].event.lock(), map.dstInOrder()[index + 1].event.lock());
+        std::vector<Neighbours> neighbours;
+        neighbours.reserve(map.dstInOrder().size());
+        const EventBase* previous = nullptr;
+        for (const CutEntry& entry : map.dstInOrder()) {
+            const EventBase* const event = entry.event.lock().get();
+            if (previous != nullptr)
+                neighbours.emplace_back(previous, event);
+            previous = event;
+        }
+        std::sort(neighbours.begin(), neighbours.end());
+        neighbours.erase(std::unique(neighbours.begin(), neighbours.end()), neighbours.end());
         return neighbours;
     };
-    const std::set<Neighbours> inSelection = neighboursOf(selected);
-    const std::set<Neighbours> inWhole = neighboursOf(whole);
+    const std::vector<Neighbours> inSelection = neighboursOf(selected);
+    const std::vector<Neighbours> inWhole = neighboursOf(whole);
     return !std::includes(inWhole.begin(), inWhole.end(), inSelection.begin(), inSelection.end());
 }
 
@@ -134,17 +143,27 @@ void EventList::healSelection(const EventList& selection, const EventList& refer
         event->setRollName(name);
 }
 
-bool EventList::canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const
+HealCheck::HealCheck(const EventList& list, const EventList& selection, const EventList& referenceList)
+    : m_referenceList(referenceList), m_selectedCount(selection.size()), m_selected(selection, Timecode::framerate()),
+      m_isFragmented(isFragmented(m_selected, list)),
+      m_collected(m_isFragmented ? EventList() : withoutHealing(list, m_selected)),
+      m_untimed(takeUntimed(m_collected).size())
 {
-    const CutMap selected(selection, Timecode::framerate());
-    if (isFragmented(selected, *this))
+}
+
+bool HealCheck::canHeal(std::int32_t healMode) const
+{
+    if (m_isFragmented)
         return false;
-    EventList collected = withoutHealing(*this, selected);
-    const EventList untimed = takeUntimed(collected);
     Settings settings;
     settings.setHealMode(healMode);
-    const std::size_t timed = HealProcessing().countAfter(collected, makeContext(referenceList, settings));
-    return timed + untimed.size() != selection.size();
+    const std::size_t timed = HealProcessing().countAfter(m_collected, makeContext(m_referenceList, settings));
+    return timed + m_untimed != m_selectedCount;
+}
+
+bool EventList::canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const
+{
+    return HealCheck(*this, selection, referenceList).canHeal(healMode);
 }
 
 void EventList::extendEvent(const std::shared_ptr<EventBase>& event, bool previous)

@@ -39,22 +39,33 @@ std::unordered_set<const EventBase*> membersOf(const EventList& list, const Even
     return members;
 }
 
-/// The events of a programme that play from `in` to `out`, each once, in the map's order.
-Events eventsPlaying(const CutMap& programme, const Timecode& in, const Timecode& out)
+/// Keeps events that it has not yet had, in the order in which they come.
+class DistinctEvents {
+public:
+    void add(const std::vector<std::weak_ptr<EventBase>>& events)
+    {
+        for (const auto& reference : events) {
+            std::shared_ptr<EventBase> event(reference);
+            if (m_known.insert(event.get()).second)
+                m_events.push_back(std::move(event));
+        }
+    }
+    Events take() { return std::move(m_events); }
+
+private:
+    Events m_events;
+    std::unordered_set<const EventBase*> m_known;
+};
+
+/// The events of a programme that play from `in` to `out`, in the map's order. One may be there twice.
+std::vector<std::weak_ptr<EventBase>> eventsPlaying(const CutMap& programme, const Timecode& in, const Timecode& out)
 {
     // Shrunk, so that a neighbour that merely touches isn't hit.
     const double start = in.toSeconds() + SameInstant;
     const double end = out.toSeconds() - SameInstant;
     if (start > end)
         throw Result::InvalidArgument;
-    Events events;
-    std::unordered_set<const EventBase*> known;
-    for (const auto& reference : programme.eventsInDestinationRange(start, end)) {
-        std::shared_ptr<EventBase> event(reference);
-        if (known.insert(event.get()).second)
-            events.push_back(std::move(event));
-    }
-    return events;
+    return programme.eventsInDestinationRange(start, end);
 }
 
 } // namespace
@@ -224,6 +235,8 @@ void DataModel::forEventsBehind(const std::vector<std::shared_ptr<EventBase>>& c
                                 TimecodeOf in, TimecodeOf out, const Take& take) const
 {
     const std::unordered_set<const EventBase*> members = membersOf(m_changeEdl, changeEvents);
+    if (members.empty())
+        return;
     const CutMap map(programme, Timecode::framerate());
     for (std::size_t index = 0; index < changeEvents.size(); ++index) {
         const std::shared_ptr<EventBase>& change = changeEvents[index];
@@ -237,8 +250,11 @@ std::vector<EventList> DataModel::eventsFor(const std::vector<std::shared_ptr<Ev
                                             const EventList& programme, TimecodeOf in, TimecodeOf out) const
 {
     std::vector<EventList> found(changeEvents.size());
-    forEventsBehind(changeEvents, programme, in, out,
-                    [&](std::size_t index, Events&& events) { found[index].append(std::move(events)); });
+    forEventsBehind(changeEvents, programme, in, out, [&](std::size_t index, const auto& events) {
+        DistinctEvents distinct;
+        distinct.add(events);
+        found[index].append(distinct.take());
+    });
     return found;
 }
 
@@ -246,15 +262,9 @@ std::vector<std::shared_ptr<EventBase>>
 DataModel::eventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents, const EventList& programme,
                         TimecodeOf in, TimecodeOf out) const
 {
-    Events found;
-    std::unordered_set<const EventBase*> known;
-    forEventsBehind(changeEvents, programme, in, out, [&](std::size_t, Events&& events) {
-        for (auto& event : events) {
-            if (known.insert(event.get()).second)
-                found.push_back(std::move(event));
-        }
-    });
-    return found;
+    DistinctEvents found;
+    forEventsBehind(changeEvents, programme, in, out, [&](std::size_t, const auto& events) { found.add(events); });
+    return found.take();
 }
 
 void DataModel::revalidateEvents()

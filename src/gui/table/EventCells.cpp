@@ -105,6 +105,7 @@ std::wstring EventCells::tooltip(const EventBase& event, int column)
     switch (column) {
     case EventColumn::State:
         return event.isValid() ? std::wstring() : joined(flawLines(event), L"\n");
+    case EventColumn::Roll:
     case EventColumn::ClipName:
     case EventColumn::EdlFile:
         return text(event, column);

@@ -2,12 +2,14 @@
 
 #include "gui/table/EventMenu.h"
 
+#include "core/change/HealCheck.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "gui/look/ShownText.h"
 #include "util/Result.h"
 
-#include <utility>
+#include <cstddef>
+#include <vector>
 
 namespace cadrel::gui {
 
@@ -20,14 +22,28 @@ bool isChangeList(const EventList& list)
     return list.listKind() == core::ListKind::Change;
 }
 
-bool canHeal(const EventList& list, const EventList& newList, const EventList& selection, int mode)
+/// Whether each of the items can heal the selection.
+std::vector<bool> canHeal(const EventList& list, const EventList& newList, const EventRows::Events& selected,
+                          const std::vector<int>& ids)
 {
+    std::vector<bool> can(ids.size());
+    const EventList selection = EventRows::listOf(selected);
+    const auto askEach = [&](const core::HealCheck& check) {
+        for (std::size_t index = 0; index < ids.size(); ++index) {
+            try {
+                can[index] = check.canHeal(EventMenu::healMode(ids[index]));
+            } catch (util::Result::Type) {
+                // Healing would fail too.
+                can[index] = false;
+            }
+        }
+    };
     try {
-        return list.canHeal(selection, newList, mode);
+        askEach(core::HealCheck(list, selection, newList));
     } catch (util::Result::Type) {
-        // Healing would fail too.
-        return false;
+        // Nothing can be healed then.
     }
+    return can;
 }
 
 bool canExtend(int id, const EventList& list, const std::shared_ptr<core::EventBase>& event)
@@ -38,12 +54,14 @@ bool canExtend(int id, const EventList& list, const std::shared_ptr<core::EventB
 
 EventMenu::Item healingMenu(const EventList& list, const EventList& newList, const EventRows::Events& selected)
 {
-    const EventList selection = EventRows::listOf(selected);
+    const std::vector<int> ids = {EventMenu::HealNone, EventMenu::HealNormal, EventMenu::HealGapsWithoutInserts,
+                                  EventMenu::HealGapsWithInserts};
+    const std::vector<bool> can = canHeal(list, newList, selected, ids);
     EventMenu::Item menu = {EventMenu::Separator, translated(L"Healing"), true, {}};
-    for (const auto& [id, text] : {std::pair(EventMenu::HealNone, L"None"), std::pair(EventMenu::HealNormal, L"Normal"),
-                                   std::pair(EventMenu::HealGapsWithoutInserts, L"Gaps without Inserts"),
-                                   std::pair(EventMenu::HealGapsWithInserts, L"Gaps with Inserts")}) {
-        menu.children.push_back({id, translated(text), canHeal(list, newList, selection, EventMenu::healMode(id)), {}});
+    std::size_t index = 0;
+    for (const wchar_t* const text : {L"None", L"Normal", L"Gaps without Inserts", L"Gaps with Inserts"}) {
+        menu.children.push_back({ids[index], translated(text), can[index], {}});
+        ++index;
     }
     return menu;
 }
@@ -62,7 +80,8 @@ EventMenu::Item extendMenu(const EventList& list, const std::shared_ptr<core::Ev
 
 } // namespace
 
-EventMenu::EventMenu(const EventList& list, const EventList& newList, const EventRows::Events& selected)
+EventMenu::EventMenu(const EventList& list, const EventList& newList, const EventRows::Events& selected,
+                     const std::shared_ptr<core::EventBase>& clicked)
 {
     if (isChangeList(list)) {
         m_items.push_back(healingMenu(list, newList, selected));
@@ -73,7 +92,7 @@ EventMenu::EventMenu(const EventList& list, const EventList& newList, const Even
             m_items.push_back(extendMenu(list, selected.front()));
             m_items.emplace_back();
         }
-        m_items.push_back({Edit, translated(L"Edit"), allowsEdit(selected.front()), {}});
+        m_items.push_back({Edit, translated(L"Edit"), clicked == selected.front() && allowsEdit(clicked), {}});
     }
     m_items.push_back({Delete, translated(L"Delete"), true, {}});
 }
@@ -85,7 +104,7 @@ bool EventMenu::allows(int id, const EventList& list, const EventList& newList, 
     if (id == Delete)
         return true;
     if (isHealing(id))
-        return isChangeList(list) && canHeal(list, newList, EventRows::listOf(selected), healMode(id));
+        return isChangeList(list) && canHeal(list, newList, selected, {id}).front();
     if (selected.size() != 1)
         return false;
     if (id == Edit)

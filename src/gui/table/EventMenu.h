@@ -39,8 +39,10 @@ public:
         std::vector<Item> children;
     };
 
-    /// The menu asks the lists at once. `newList` is the new EDL, against which healing finds inserts.
-    EventMenu(const core::EventList& list, const core::EventList& newList, const EventRows::Events& selected);
+    /// The menu asks the lists at once. `newList` is the new EDL, against which healing finds inserts. `clicked` is the event
+    /// at which the menu is opened; only it can be edited, and only while it is selected.
+    EventMenu(const core::EventList& list, const core::EventList& newList, const EventRows::Events& selected,
+              const std::shared_ptr<core::EventBase>& clicked);
 
     const std::vector<Item>& items() const { return m_items; }
 

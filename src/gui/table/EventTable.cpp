@@ -15,8 +15,12 @@ namespace {
 constexpr int HeaderHeight = 20;
 /// Narrow enough for all columns beside it in the smallest window.
 constexpr int ScrollBarWidth = 12;
-/// JUCE has no name for it, and doesn't send it as a pressed key. The upper bits are those of all keys without a letter.
+
+#if JUCE_LINUX || JUCE_BSD
+/// The Menu key, XK_Menu of X11. JUCE has no name for it, and doesn't send it as a pressed key. The upper bits are those of
+/// all keys without a letter.
 const int MenuKey = (juce::KeyPress::F10Key & ~0xff) | 0x67;
+#endif
 
 } // namespace
 
@@ -104,9 +108,26 @@ bool EventTable::keyStateChanged(bool isKeyDown)
     return isUsed;
 }
 
+void EventTable::focusGained(FocusChangeType cause)
+{
+    guardSystem([&] {
+        juce::TableListBox::focusGained(cause);
+        readMenuKey();
+    });
+}
+
+void EventTable::menuClosed()
+{
+    readMenuKey();
+}
+
 bool EventTable::isMenuKeyDown() const
 {
+#if JUCE_LINUX || JUCE_BSD
     return getPeer() != nullptr && juce::KeyPress::isKeyCurrentlyDown(MenuKey);
+#else
+    return false;
+#endif
 }
 
 } // namespace cadrel::gui

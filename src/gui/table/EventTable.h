@@ -18,6 +18,9 @@ public:
     juce::Component* refreshComponentForRow(int row, bool isSelected, juce::Component* existing) override;
     bool keyPressed(const juce::KeyPress& key) override;
     bool keyStateChanged(bool isKeyDown) override;
+    void focusGained(FocusChangeType cause) override;
+    /// The menu is closed. A key may have gone up while it had the keys.
+    void menuClosed();
 
 private:
     /// Null without an EventTableModel.
@@ -25,6 +28,7 @@ private:
     juce::String getNameForRow(int row) override;
     bool handleKey(const juce::KeyPress& key);
     bool isMenuKeyDown() const;
+    void readMenuKey() { m_wasMenuKeyDown = isMenuKeyDown(); }
 
     bool m_wasMenuKeyDown = false;
 };

@@ -9,9 +9,11 @@
 #include "gui/table/EventCells.h"
 #include "gui/table/EventEdits.h"
 #include "gui/table/EventMenu.h"
+#include "gui/table/EventTable.h"
 #include "gui/table/EventTablePainter.h"
 
 #include <algorithm>
+#include <unordered_set>
 #include <utility>
 
 namespace cadrel::gui {
@@ -135,11 +137,10 @@ template <class Action>
 void EventTableModel::tell(const Action& action)
 {
     const Life life = m_life;
-    for (std::size_t index = m_listeners.size(); index > 0;) {
-        action(*m_listeners[--index]);
-        if (life.expired())
-            return;
-        index = std::min(index, m_listeners.size());
+    const std::vector<Listener*> called = m_listeners;
+    for (auto listener = called.rbegin(); listener != called.rend() && !life.expired(); ++listener) {
+        if (std::find(m_listeners.begin(), m_listeners.end(), *listener) != m_listeners.end())
+            action(**listener);
     }
 }
 
@@ -167,11 +168,11 @@ void EventTableModel::setHighlight(const Events& events)
 
 // What is kept while the rows change.
 
-bool EventTableModel::isInView(int row) const
+bool EventTableModel::isPartlyInView(int row) const
 {
     const int height = m_table->getRowHeight();
     const juce::Range<int> place(row * height, (row + 1) * height);
-    return m_table->getViewport()->getViewArea().getVerticalRange().contains(place);
+    return m_table->getViewport()->getViewArea().getVerticalRange().intersects(place);
 }
 
 EventTableModel::Place EventTableModel::place() const
@@ -181,13 +182,13 @@ EventTableModel::Place EventTableModel::place() const
         return found;
     const int anchor = m_table->getLastRowSelected();
     found.anchor = m_rows.eventAt(anchor);
-    if (found.anchor && isInView(anchor)) {
+    if (found.anchor && isPartlyInView(anchor)) {
         found.watched = found.anchor;
         return found;
     }
     const int first = m_table->getViewport()->getViewPositionY() / m_table->getRowHeight();
     for (int row = first; row <= first + m_table->getNumRowsOnScreen() && !found.watched; ++row) {
-        if (m_rows.selection().contains(row) && isInView(row))
+        if (m_rows.selection().contains(row) && isPartlyInView(row))
             found.watched = m_rows.eventAt(row);
     }
     return found;
@@ -327,7 +328,8 @@ void EventTableModel::cellClicked(int row, int, const juce::MouseEvent& event)
 void EventTableModel::cellDoubleClicked(int row, int, const juce::MouseEvent& event)
 {
     guardUser([&] {
-        if (!event.mods.isPopupMenu() && m_rows.selection().contains(row) && getNumSelectedRows() == 1)
+        if (event.mods.isLeftButtonDown() && !event.mods.isPopupMenu() && m_rows.selection().contains(row) &&
+            getNumSelectedRows() == 1)
             requestEdit(m_rows.eventAt(row), event.getScreenPosition());
     });
 }
@@ -377,30 +379,37 @@ void EventTableModel::openMenuAt(juce::Point<int> position, int row)
     const Events selected = getSelectedEvents();
     if (selected.empty() || m_table == nullptr)
         return;
+    const std::shared_ptr<EventBase> clicked = m_rows.eventAt(row);
     juce::PopupMenu menu;
-    addItems(menu, EventMenu(*m_list, m_dataModel.newEdl(), selected).items());
+    addItems(menu, EventMenu(*m_list, m_dataModel.newEdl(), selected, clicked).items());
     m_presentMenu(menu, position,
-                  [this, life = Life(m_life), table = m_table, position, row,
+                  [this, life = Life(m_life), table = m_table, position, clicked = std::weak_ptr<EventBase>(clicked),
                    offered = std::vector<std::weak_ptr<EventBase>>(selected.begin(), selected.end())](int id) {
-                      if (!life.expired() && table != nullptr)
-                          guardUser([&] { menuAnswered(id, offered, position, row); });
+                      if (life.expired() || table == nullptr)
+                          return;
+                      guardUser([&] {
+                          if (auto* const keys = dynamic_cast<EventTable*>(table.getComponent()))
+                              keys->menuClosed();
+                          menuAnswered(id, offered, position, clicked.lock());
+                      });
                   });
 }
 
 void EventTableModel::menuAnswered(int id, const std::vector<std::weak_ptr<EventBase>>& offered,
-                                   juce::Point<int> position, int row)
+                                   juce::Point<int> position, const std::shared_ptr<EventBase>& clicked)
 {
-    Events events;
-    events.reserve(offered.size());
+    std::unordered_set<std::shared_ptr<EventBase>> events;
     for (const auto& event : offered)
-        events.push_back(event.lock());
-    // Another selection would be another menu.
-    if (events != getSelectedEvents() || !EventMenu::allows(id, *m_list, m_dataModel.newEdl(), events))
+        events.insert(event.lock());
+    const Events selected = getSelectedEvents();
+    // Another selection would be another menu. It may have been sorted meanwhile.
+    if (events != std::unordered_set<std::shared_ptr<EventBase>>(selected.begin(), selected.end()) ||
+        !EventMenu::allows(id, *m_list, m_dataModel.newEdl(), selected))
         return;
-    if (id == EventMenu::Edit)
-        requestEdit(events.front(), position);
-    else
-        edit(id, row);
+    if (id != EventMenu::Edit)
+        edit(id, m_rows.rowOf(clicked));
+    else if (selected.front() == clicked)
+        requestEdit(clicked, position);
 }
 
 // Edits.
@@ -426,34 +435,47 @@ bool EventTableModel::mayGoOn(const Life& life, const Events& events) const
 
 void EventTableModel::changeList(int id, const Events& events, int row)
 {
-    if (EventMenu::isExtending(id)) {
-        EventEdits::apply(id, *m_list, m_dataModel.newEdl(), events);
-        return;
-    }
+    const bool keepsSelection = EventMenu::isExtending(id);
     const Life life = m_life;
     const int next = rowAfterRemoval(events, row);
     try {
         const Silence silence(*this);
-        selectNothing();
+        if (!keepsSelection)
+            selectNothing();
         m_isStale = true;
         EventEdits::apply(id, *m_list, m_dataModel.newEdl(), events);
         if (life.expired())
             return;
-        if (m_isStale)
-            reload(*m_list);
-        if (id == EventMenu::Delete && m_rows.count() > 0 && m_table != nullptr) {
-            const int selected = std::min(next, m_rows.count() - 1);
-            RowSet rows;
-            rows.append(selected);
-            m_rows.select(rows);
-            m_table->selectRow(selected, false, true);
-        }
+        reloadIfStale();
+        if (id == EventMenu::Delete)
+            selectAfterRemoval(next);
     } catch (...) {
+        // The list may have changed all the same.
         if (!life.expired())
+            reloadIfStale();
+        if (!life.expired() && !keepsSelection)
             tellSelectionChanged();
         throw;
     }
-    tellSelectionChanged();
+    if (!keepsSelection)
+        tellSelectionChanged();
+}
+
+void EventTableModel::reloadIfStale()
+{
+    if (m_isStale)
+        reload(*m_list);
+}
+
+void EventTableModel::selectAfterRemoval(int row)
+{
+    if (m_rows.count() == 0 || m_table == nullptr)
+        return;
+    const int selected = std::min(row, m_rows.count() - 1);
+    RowSet rows;
+    rows.append(selected);
+    m_rows.select(rows);
+    m_table->selectRow(selected, false, true);
 }
 
 int EventTableModel::rowAfterRemoval(const Events& removed, int row) const

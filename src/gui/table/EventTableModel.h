@@ -55,7 +55,7 @@ public:
     void reload(core::EventList& list);
 
     /// Null, and a listener that is there already, are ignored. Not owned. The last that was added is called first. Listeners
-    /// may be added and removed while they are called.
+    /// may be added and removed while they are called; one that is added isn't called then.
     void addListener(Listener* listener);
     void removeListener(Listener* listener);
 
@@ -118,12 +118,12 @@ private:
     };
     Place place() const;
     void restore(const Place& place);
-    bool isInView(int row) const;
+    bool isPartlyInView(int row) const;
 
     bool sortBy(const SortKey& key);
     void openMenuAt(juce::Point<int> position, int row);
     void menuAnswered(int id, const std::vector<std::weak_ptr<core::EventBase>>& offered, juce::Point<int> position,
-                      int row);
+                      const std::shared_ptr<core::EventBase>& clicked);
     juce::Point<int> screenPositionOf(int row) const;
     void requestEdit(const std::shared_ptr<core::EventBase>& event, juce::Point<int> position);
     /// Carries out an edit that is allowed for the selected events. `row` is the one that was clicked or selected last.
@@ -131,6 +131,8 @@ private:
     /// Whether the edit may go on after a call of the host.
     bool mayGoOn(const Life& life, const Events& events) const;
     void changeList(int id, const Events& events, int row);
+    void reloadIfStale();
+    void selectAfterRemoval(int row);
     int rowAfterRemoval(const Events& removed, int row) const;
     void selectNothing();
 

@@ -56,6 +56,8 @@ std::string RowSet::toText() const
 
 void RowSet::append(int first, int end)
 {
+    if (!m_ranges.empty())
+        first = std::max(first, m_ranges.back().end);
     if (first >= end)
         return;
     if (!m_ranges.empty() && m_ranges.back().end == first)

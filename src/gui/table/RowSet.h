@@ -26,7 +26,7 @@ public:
     /// The row numbers in ascending order, joined with ";".
     std::string toText() const;
 
-    /// Appends the rows from `first` to the one before `end`, all of them after the rows that are there.
+    /// Appends the rows from `first` to the one before `end`. Those that do not come after the last row are left out.
     void append(int first, int end);
     void append(int row) { append(row, row + 1); }
 

@@ -146,14 +146,25 @@ void EventTimeLine::highlight(const std::vector<std::shared_ptr<EventBase>>& eve
         placed.isHighlighted = highlighted.contains(placed.event.lock().get());
 }
 
-std::vector<const EventTimeLine::PlacedEvent*> EventTimeLine::fromTheTop() const
+std::vector<EventTimeLine::Span> EventTimeLine::spansFromTheTop(Lane lane, double scale, int columns, int least) const
 {
-    std::vector<const PlacedEvent*> events;
-    events.reserve(m_events.size());
-    for (auto event = m_events.rbegin(); event != m_events.rend(); ++event)
-        events.push_back(&*event);
-    std::stable_partition(events.begin(), events.end(), [](const PlacedEvent* event) { return event->isHighlighted; });
-    return events;
+    const auto columnOf = [&](double seconds) {
+        return static_cast<int>(std::lround((seconds - m_axis.start) * scale));
+    };
+    std::vector<Span> spans;
+    spans.reserve(m_events.size());
+    for (auto event = m_events.rbegin(); event != m_events.rend(); ++event) {
+        const SecondsRange& times = lane == Lane::Source ? event->source : event->destination;
+        const int first = std::min(columnOf(times.start), columns - least);
+        const int end = columnOf(times.end);
+        spans.push_back({first, std::max(end, first + least), end < first + least, &*event});
+    }
+    const auto others =
+        std::stable_partition(spans.begin(), spans.end(), [](const Span& span) { return span.event->isHighlighted; });
+    const auto isWidened = [](const Span& span) { return span.isWidened; };
+    std::stable_partition(spans.begin(), others, isWidened);
+    std::stable_partition(others, spans.end(), isWidened);
+    return spans;
 }
 
 std::vector<TimeLineBlock> EventTimeLine::blocks(Lane lane, int columns, int leastColumns) const
@@ -162,23 +173,15 @@ std::vector<TimeLineBlock> EventTimeLine::blocks(Lane lane, int columns, int lea
     if (!std::isfinite(scale) || !(scale > 0.0))
         return {};
 
-    const auto columnOf = [&](double seconds) {
-        return static_cast<int>(std::lround((seconds - m_axis.start) * scale));
-    };
-    const int least = std::clamp(leastColumns, 1, columns);
+    const std::vector<Span> spans = spansFromTheTop(lane, scale, columns, std::clamp(leastColumns, 1, columns));
     Columns taken(static_cast<std::size_t>(columns));
-    const std::vector<const PlacedEvent*> events = fromTheTop();
-    for (std::size_t index = 0; index < events.size(); ++index) {
-        const SecondsRange& times = lane == Lane::Source ? events[index]->source : events[index]->destination;
-        const int first = std::min(columnOf(times.start), columns - least);
-        const int end = std::max(columnOf(times.end), first + least);
-        taken.take(static_cast<std::size_t>(first), static_cast<std::size_t>(end), index);
-    }
+    for (std::size_t index = 0; index < spans.size(); ++index)
+        taken.take(static_cast<std::size_t>(spans[index].first), static_cast<std::size_t>(spans[index].end), index);
 
     std::vector<TimeLineBlock> blocks;
     taken.forEachStretch([&](std::size_t first, std::size_t end, std::size_t owner) {
-        blocks.push_back(
-            {static_cast<int>(first), static_cast<int>(end), events[owner]->isVfx, events[owner]->isHighlighted});
+        const PlacedEvent& event = *spans[owner].event;
+        blocks.push_back({static_cast<int>(first), static_cast<int>(end), event.isVfx, event.isHighlighted});
     });
     return blocks;
 }

@@ -26,8 +26,8 @@ struct TimeLineBlock {
 };
 
 /// Where the events of a list lie on the two lanes of the timeline, in columns of pixels. A column shows one event only: a
-/// highlighted one if there is any, else the last of the list. So a lane has no more blocks than columns, however long the
-/// list is:
+/// highlighted one if there is any, of these one that had to be widened to be seen, and of these the last of the list. So a
+/// lane has no more blocks than columns, however long the list is:
 ///
 ///     event 1         |-------------------------|
 ///     event 2   |----------|
@@ -63,8 +63,14 @@ private:
         bool isHighlighted;
     };
 
-    /// The events from the topmost to the lowest.
-    std::vector<const PlacedEvent*> fromTheTop() const;
+    /// The columns of an event on a lane, before others cover them.
+    struct Span {
+        int first;
+        int end;
+        bool isWidened; ///< the event alone has fewer columns
+        const PlacedEvent* event;
+    };
+    std::vector<Span> spansFromTheTop(Lane lane, double scale, int columns, int least) const;
 
     std::vector<PlacedEvent> m_events; ///< in the list's order
     core::SecondsRange m_axis;

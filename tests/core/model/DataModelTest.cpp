@@ -647,6 +647,15 @@ TEST_F(BehindAChange, StandTheEventsOfManyChangesOnceEach)
     EXPECT_TRUE(model.newEventsBehind({b, y}).empty());
 }
 
+TEST_F(BehindAChange, NothingOfTheProgrammesIsReadWhereNoChangeIsAsked)
+{
+    const NoProject none;
+    EXPECT_TRUE(model.oldEventsBehind({}).empty());
+    EXPECT_TRUE(model.newEventsBehind({}).empty());
+    EXPECT_TRUE(model.oldEventsBehind({b, nullptr}).empty());
+    EXPECT_TRUE(model.oldEventsFor(y).isEmpty());
+}
+
 TEST_F(BehindAChange, ARangeShorterThanTheToleranceFails)
 {
     const auto event = change("00:00:22:00", "00:00:22:01", "00:02:00:00", "00:02:00:01");

@@ -73,16 +73,17 @@ TEST_F(EventCellsTest, ShowReplacementsInNamesThatAreNoUtf8)
     EXPECT_EQ(EventCells::tooltip(*m_event, EventColumn::ClipName), L"K\ufffdste");
 }
 
-TEST_F(EventCellsTest, HaveTooltipsForClipNameFileAndState)
+TEST_F(EventCellsTest, HaveTooltipsForNamesAndState)
 {
     m_event->setClipName("42A-3 Maren");
     m_event->setEdlFileName("reel3_v07.edl");
     m_event->addFlaw(EventFlaw::NotVideoEvent);
 
+    EXPECT_EQ(EventCells::tooltip(*m_event, EventColumn::Roll), L"A001");
     EXPECT_EQ(EventCells::tooltip(*m_event, EventColumn::ClipName), L"42A-3 Maren");
     EXPECT_EQ(EventCells::tooltip(*m_event, EventColumn::EdlFile), L"reel3_v07.edl");
     EXPECT_EQ(EventCells::tooltip(*m_event, EventColumn::State), L"Not a video event.");
-    for (const int column : {0, 2, 3, 6, 7, 8, 9, 10, 11})
+    for (const int column : {0, 2, 6, 7, 8, 9, 10, 11})
         EXPECT_EQ(EventCells::tooltip(*m_event, column), L"") << column;
 }
 

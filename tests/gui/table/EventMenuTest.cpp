@@ -43,7 +43,7 @@ class EventMenuTest : public testing::Test {
 protected:
     std::wstring menuOf(const EventList& list, const Events& selected) const
     {
-        return textOf(EventMenu(list, m_newList, selected).items());
+        return textOf(EventMenu(list, m_newList, selected, selected.front()).items());
     }
     bool allows(int id, const Events& selected) const { return EventMenu::allows(id, m_change, m_newList, selected); }
 
@@ -163,7 +163,7 @@ TEST_F(EventMenuTest, AllowsWhatItOffers)
 {
     for (const Events& selected :
          {Events{m_first}, Events{m_third}, Events{m_first, m_second}, Events{m_first, m_third}}) {
-        const EventMenu menu(m_change, m_newList, selected);
+        const EventMenu menu(m_change, m_newList, selected, selected.front());
         for (const EventMenu::Item& item : menu.items()) {
             if (item.id != EventMenu::Separator) {
                 EXPECT_EQ(allows(item.id, selected), item.isEnabled);

@@ -2,6 +2,7 @@
 
 #include "gui/table/EventTableModel.h"
 
+#include "gui/look/Text.h"
 #include "gui/table/EventMenu.h"
 #include "tests/gui/table/ShownTable.h"
 #include "tests/support/core/EventMaking.h"
@@ -24,6 +25,17 @@ using cadrel::tests::pumpMessages;
 namespace {
 
 class EventTableModelTest : public cadrel::tests::ShownTable {};
+
+bool isSame(const juce::Image& image, const juce::Image& other)
+{
+    for (int y = 0; y < image.getHeight(); ++y) {
+        for (int x = 0; x < image.getWidth(); ++x) {
+            if (image.getPixelAt(x, y) != other.getPixelAt(x, y))
+                return false;
+        }
+    }
+    return true;
+}
 
 using Rows = std::vector<int>;
 
@@ -153,6 +165,26 @@ TEST_F(EventTableModelTest, KeepsASelectedRowInView)
     EXPECT_TRUE(isInView(150));
 }
 
+TEST_F(EventTableModelTest, KeepsASelectedRowInViewOfWhichAPartWasSeen)
+{
+    for (int index = 0; index < 200; ++index)
+        add();
+    EventTableModel& model = show();
+    const int height = m_table.getRowHeight();
+    // The last that was selected, and one that wasn't.
+    for (const std::vector<int>& rows : {Rows{150}, Rows{150, 10}}) {
+        model.applySort(EventColumn::DstIn, false);
+        select(rows);
+        m_table.getViewport()->setViewPosition(0, 151 * height - 1);
+        model.applySort(EventColumn::DstIn, true);
+        EXPECT_TRUE(isInView(49)) << rows.size();
+
+        m_table.getViewport()->setViewPosition(0, 50 * height);
+        model.applySort(EventColumn::DstIn, false);
+        EXPECT_FALSE(isInView(150)) << rows.size();
+    }
+}
+
 TEST_F(EventTableModelTest, DoesNotScrollToASelectedRowThatWasOutOfView)
 {
     for (int index = 0; index < 200; ++index)
@@ -273,8 +305,12 @@ TEST_F(EventTableModelTest, SurvivesEventsThatHaveGone)
     juce::Graphics graphics(image);
     for (int row = -1; row < 4; ++row) {
         model.paintRowBackground(graphics, row, 100, 20, true);
+        const juce::Image background = image.createCopy();
+        EXPECT_EQ(background.getPixelAt(1, 10), cadrel::gui::toColour(cadrel::gui::Palette::panel)) << row;
+        EXPECT_EQ(background.getPixelAt(50, 10), cadrel::gui::toColour(cadrel::gui::Palette::selection)) << row;
         for (int column = 0; column < 12; ++column) {
             model.paintCell(graphics, row, column, 100, 20, false);
+            EXPECT_TRUE(isSame(image, background)) << row << ", " << column;
             EXPECT_TRUE(model.getCellTooltip(row, column).isEmpty());
             EXPECT_TRUE(model.getSpokenCell(row, column).isEmpty());
         }
@@ -296,7 +332,8 @@ TEST_F(EventTableModelTest, HasTheTooltipsOfTheCells)
     EventTableModel& model = show();
     EXPECT_EQ(model.getCellTooltip(0, EventColumn::State), "Not a video event.");
     EXPECT_EQ(model.getCellTooltip(0, EventColumn::ClipName), "42A-3 Maren");
-    EXPECT_EQ(model.getCellTooltip(0, EventColumn::Roll), "");
+    EXPECT_EQ(model.getCellTooltip(0, EventColumn::Roll), "A001");
+    EXPECT_EQ(model.getCellTooltip(0, EventColumn::SrcIn), "");
 }
 
 TEST_F(EventTableModelTest, MakesNoComponentsForCells)
@@ -370,6 +407,26 @@ TEST_F(EventTableModelTest, LetsListenersLeaveWhileTheyAreCalled)
 
     m_table.selectRow(0);
     EXPECT_EQ(calls, (Steps{"third", "first"}));
+}
+
+TEST_F(EventTableModelTest, CallsEachListenerOnceAlsoWhenOneRemovesAnEarlierOne)
+{
+    add();
+    EventTableModel& model = show();
+    std::vector<std::string> calls;
+    Caller first("first", calls);
+    Caller second("second", calls);
+    Caller third("third", calls);
+    Caller late("late", calls);
+    for (Caller* const caller : {&first, &second, &third})
+        model.addListener(caller);
+    third.then = [&] {
+        model.removeListener(&first);
+        model.addListener(&late);
+    };
+
+    m_table.selectRow(0);
+    EXPECT_EQ(calls, (Steps{"third", "second"}));
 }
 
 TEST_F(EventTableModelTest, MayGoWhileItTells)
@@ -541,6 +598,34 @@ TEST_F(EventTableModelTest, DoesNothingWhenAnotherEventIsSelectedBeforeTheAnswer
     select({1});
     m_choose(EventMenu::Delete);
     EXPECT_EQ(list().size(), 2U);
+}
+
+TEST_F(EventTableModelTest, TakesTheAnswerForTheSameEventsInAnotherOrder)
+{
+    Events events;
+    for (int index = 0; index < 5; ++index)
+        events.push_back(add());
+    EventTableModel& model = show();
+    select({0, 1});
+    rightClick(1);
+    model.applySort(EventColumn::DstIn, true);
+    m_choose(EventMenu::Delete);
+    EXPECT_EQ(list().events(), (Events{events[2], events[3], events[4]}));
+    // What followed the event that was clicked has moved up: nothing, so the row before.
+    EXPECT_EQ(model.getSelectedEvents(), (Events{events[2]}));
+}
+
+TEST_F(EventTableModelTest, EditsOnlyTheEventThatWasClicked)
+{
+    add();
+    add();
+    EventTableModel& model = show();
+    select({0});
+    // A click with the Control key has taken the second row out of the selection.
+    model.cellClicked(1, 1, mouseAt(1, juce::ModifierKeys::rightButtonModifier));
+    EXPECT_EQ(m_menuText, "Healing(1- 2- 3- 4- )|Extend Event(7- 8- 9- )|6- 5 ");
+    m_choose(EventMenu::Edit);
+    EXPECT_EQ(m_edited, nullptr);
 }
 
 TEST_F(EventTableModelTest, DoesNothingThatIsNoLongerAllowedAtTheAnswer)
@@ -746,6 +831,43 @@ TEST_F(EventTableModelTest, TellsOfTheLostSelectionAlsoWhenAnEditFails)
     EXPECT_EQ(m_steps, (Steps{"selection", "selection"}));
 }
 
+TEST_F(EventTableModelTest, ShowsTheListAsItIsWhenAnEditFailsAndNobodyReloads)
+{
+    cadrel::tests::RecordingAlerts alerts;
+    const auto first = add();
+    add();
+    EventTableModel& model = show();
+    m_reloads = false;
+    select({1});
+    FailingListener failing;
+    m_edits.addListener(&failing);
+    model.deleteKeyPressed(1);
+    m_edits.removeListener(&failing);
+
+    EXPECT_EQ(alerts.messages.size(), 1U);
+    EXPECT_EQ(model.getNumRows(), 1);
+    EXPECT_EQ(m_table.getNumRows(), 1);
+    m_table.selectRow(0);
+    EXPECT_EQ(model.getSelectedEvents(), (Events{first}));
+}
+
+TEST_F(EventTableModelTest, SortsAnExtendedEventAnewWhereNobodyReloads)
+{
+    const auto first = add();
+    list().add(cadrel::tests::makeEvent("A", "00:00:10:00", "00:00:20:00", "01:05:00:00", "01:05:10:00"));
+    EventTableModel& model = show();
+    m_reloads = false;
+    model.applySort(EventColumn::SrcOut, false);
+    select({0});
+    rightClick(0);
+    m_steps.clear();
+    m_choose(EventMenu::ExtendNext);
+    ASSERT_EQ(first->srcOut().toString(), "00:05:00:00");
+    EXPECT_EQ(selectedRows(), (Rows{1}));
+    EXPECT_EQ(model.getSelectedEvents(), (Events{first}));
+    EXPECT_TRUE(m_steps.empty());
+}
+
 // Editing by mouse and keys.
 
 TEST_F(EventTableModelTest, AsksForAnEditAtADoubleClickAndReturn)
@@ -776,6 +898,7 @@ TEST_F(EventTableModelTest, AsksForNoEditOfSeveralEventsOrOfOneThatMayNotBeEdite
     model.returnKeyPressed(-1);
     doubleClick(1, juce::ModifierKeys::leftButtonModifier);
     doubleClick(0, juce::ModifierKeys::rightButtonModifier);
+    doubleClick(0, juce::ModifierKeys::middleButtonModifier);
     flawed->setDstIn({0, 0, 0, 99});
     // Its row has moved to the top.
     select({0});

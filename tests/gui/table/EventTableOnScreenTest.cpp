@@ -66,6 +66,13 @@ protected:
 
 using Rows = std::vector<int>;
 
+constexpr unsigned long MenuKey = 0xff67;
+
+bool isMenuKeyDown()
+{
+    return KeyPress::isKeyCurrentlyDown((KeyPress::F10Key & ~0xff) | 0x67);
+}
+
 } // namespace
 
 TEST_F(EventTableOnScreenTest, DeletesByTheMenuOfARightClick)
@@ -100,10 +107,9 @@ TEST_F(EventTableOnScreenTest, EditsAtADoubleClick)
 
 TEST_F(EventTableOnScreenTest, OpensItsMenuWithTheMenuKeyOnceWhileItIsHeld)
 {
-    constexpr unsigned long menuKey = 0xff67;
     select({1});
     cadrel::tests::XUser user;
-    user.hold(menuKey);
+    user.hold(MenuKey);
     ASSERT_TRUE(waitForMenu());
     openMenu()->keyPressed(KeyPress(KeyPress::escapeKey));
     EXPECT_TRUE(window().serveUntil([] { return openMenu() == nullptr; }));
@@ -111,9 +117,42 @@ TEST_F(EventTableOnScreenTest, OpensItsMenuWithTheMenuKeyOnceWhileItIsHeld)
     m_table.keyStateChanged(true);
     window().serve();
     EXPECT_EQ(openMenu(), nullptr);
-    user.release(menuKey);
+    user.release(MenuKey);
     window().serve();
     EXPECT_TRUE(m_edits.steps.empty());
+}
+
+TEST_F(EventTableOnScreenTest, OpensItsMenuAgainAfterTheKeyWentUpInTheMenuAndAClickBesideClosedIt)
+{
+    select({1});
+    cadrel::tests::XUser user;
+    for (int time = 1; time <= 3; ++time) {
+        user.hold(MenuKey);
+        ASSERT_TRUE(waitForMenu()) << time;
+        user.release(MenuKey);
+        ASSERT_TRUE(window().serveUntil([] { return !isMenuKeyDown(); }));
+        click(3, ModifierKeys::leftButtonModifier);
+        ASSERT_TRUE(window().serveUntil([] { return openMenu() == nullptr; }));
+        select({1});
+    }
+}
+
+TEST_F(EventTableOnScreenTest, OpensItsMenuAgainAfterTheKeyWentUpWhereTheFocusWasMeanwhile)
+{
+    select({1});
+    juce::TextEditor other;
+    window().content().addAndMakeVisible(other);
+    cadrel::tests::XUser user;
+    for (int time = 1; time <= 2; ++time) {
+        user.hold(MenuKey);
+        ASSERT_TRUE(waitForMenu()) << time;
+        openMenu()->exitModalState(0);
+        ASSERT_TRUE(window().serveUntil([] { return openMenu() == nullptr; }));
+        other.grabKeyboardFocus();
+        user.release(MenuKey);
+        ASSERT_TRUE(window().serveUntil([] { return !isMenuKeyDown(); }));
+        m_table.grabKeyboardFocus();
+    }
 }
 
 TEST_F(EventTableOnScreenTest, DoesNothingWhenItGoesWhileItsMenuIsOpen)

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "gui/look/Text.h"
 #include "gui/table/EventColumn.h"
 #include "tests/gui/table/ShownTable.h"
 #include "tests/support/window/MessagePump.h"
@@ -119,4 +120,35 @@ TEST_F(EventTablePicturesTest, Sorted)
     m_model->selectRows(RowSet::parse("0;1", 10));
     m_model->applySort(EventColumn::Roll, true);
     expectTable("table-sorted");
+}
+
+TEST_F(EventTablePicturesTest, TheDotTellsTheStateByColourAndByAMark)
+{
+    using cadrel::gui::Palette;
+    show();
+    list().at(1).addFlaw(EventFlaw::NotVideoEvent);
+    // A dot of fifty pixels from 25, 5 on, with a ring of one pixel.
+    const auto pixel = [this](int row, int x, int y) {
+        juce::Image image(juce::Image::ARGB, 100, 60, true);
+        juce::Graphics graphics(image);
+        m_model->paintCell(graphics, row, EventColumn::State, 100, 60, false);
+        return image.getPixelAt(x, y);
+    };
+    const auto colour = [](cadrel::gui::PaletteColour ofPalette) { return cadrel::gui::toColour(ofPalette); };
+    ASSERT_TRUE(m_model->getSpokenCell(0, EventColumn::State) == "Valid");
+    for (const int row : {0, 1}) {
+        EXPECT_EQ(pixel(row, 24, 30).getAlpha(), 0) << row;
+        // The ring covers nearly all of this pixel.
+        const juce::Colour ring = pixel(row, 25, 30);
+        const juce::Colour dark = colour(row == 0 ? Palette::darkGreen : Palette::darkRed);
+        EXPECT_NEAR(ring.getRed(), dark.getRed(), 2) << row;
+        EXPECT_NEAR(ring.getGreen(), dark.getGreen(), 2) << row;
+        EXPECT_NEAR(ring.getBlue(), dark.getBlue(), 2) << row;
+        EXPECT_GT(ring.getAlpha(), 240) << row;
+        EXPECT_EQ(pixel(row, 27, 30), colour(row == 0 ? Palette::green : Palette::red)) << row;
+        EXPECT_EQ(pixel(row, 50, 35), colour(row == 0 ? Palette::green : Palette::red)) << row;
+        // The stroke and the point of the exclamation mark.
+        EXPECT_EQ(pixel(row, 50, 20), colour(row == 0 ? Palette::green : Palette::light)) << row;
+        EXPECT_EQ(pixel(row, 50, 42), colour(row == 0 ? Palette::green : Palette::light)) << row;
+    }
 }

@@ -101,7 +101,7 @@ TEST_F(EventTableTest, HasRoomForTimecodesAndNumbers)
 {
     const juce::Font font = cadrel::gui::getFont(5);
     EXPECT_LE(font.getStringWidthFloat("23:59:59:29"), 65.0F - 4.0F);
-    EXPECT_LE(font.getStringWidthFloat("99999"), 40.0F - 4.0F);
+    EXPECT_LE(font.getStringWidthFloat("100000"), 40.0F - 4.0F);
     EXPECT_LE(font.getStringWidthFloat("D"), 30.0F - 4.0F);
 }
 

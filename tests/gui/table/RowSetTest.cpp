@@ -45,6 +45,20 @@ TEST(RowSet, AppendsNothingOfAnEmptyRange)
     EXPECT_TRUE(rows.isEmpty());
 }
 
+TEST(RowSet, AppendsOnlyWhatComesAfterItsLastRow)
+{
+    RowSet rows;
+    rows.append(5, 8);
+    rows.append(1, 3);
+    rows.append(4, 8);
+    EXPECT_EQ(rows.ranges(), (std::vector<RowSet::Range>{{5, 8}}));
+    rows.append(7, 9);
+    rows.append(2, 12);
+    EXPECT_EQ(rows.ranges(), (std::vector<RowSet::Range>{{5, 12}}));
+    rows.append(13, 14);
+    EXPECT_EQ(rows.ranges(), (std::vector<RowSet::Range>{{5, 12}, {13, 14}}));
+}
+
 TEST(RowSet, ContainsTheRowsOfItsRanges)
 {
     const RowSet rows = rowsOf({3, 4, 8});

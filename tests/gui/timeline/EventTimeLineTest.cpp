@@ -110,6 +110,36 @@ TEST_F(EventTimeLineTest, ShowsAShortEventAtLeastSoWide)
     EXPECT_EQ(m_line.blocks(Lane::Destination, 100, 2), (Blocks{{0, 10}, {10, 12}, {12, 100}}));
 }
 
+TEST_F(EventTimeLineTest, ShowsAnEventThatIsShorterThanItsColumnAlsoWhereTheNextBeginsInIt)
+{
+    add("00:00:00:00", "00:00:11:00", "00:00:00:00", "00:00:11:00");
+    const auto shorter = add("00:00:11:00", "00:00:11:01", "00:00:11:00", "00:00:11:01");
+    const auto next = add("00:00:11:01", "00:01:40:00", "00:00:11:01", "00:01:40:00");
+    m_line.setEvents(m_list);
+    // One column a second.
+    EXPECT_EQ(m_line.blocks(Lane::Source, 100, 1), (Blocks{{0, 11}, {11, 12}, {12, 100}}));
+    EXPECT_EQ(m_line.blocks(Lane::Destination, 100, 2), (Blocks{{0, 11}, {11, 13}, {13, 100}}));
+
+    m_line.highlight({next});
+    EXPECT_EQ(m_line.blocks(Lane::Source, 100, 1), (Blocks{{0, 11}, {11, 100, false, true}}));
+    // Among highlighted ones too.
+    shorter->setVfx(true);
+    m_line.setEvents(m_list);
+    m_line.highlight({shorter, next});
+    EXPECT_EQ(m_line.blocks(Lane::Source, 100, 1), (Blocks{{0, 11}, {11, 12, true, true}, {12, 100, false, true}}));
+}
+
+TEST_F(EventTimeLineTest, ShowsOverALaterEventOnlyWhatHadToBeWidened)
+{
+    add("00:00:10:00", "00:00:12:00", "00:00:10:00", "00:00:11:00")->setVfx(true);
+    add("00:00:00:00", "00:01:40:00", "00:00:00:00", "00:01:40:00");
+    m_line.setEvents(m_list);
+    // Two columns are enough for two seconds, and not for one.
+    EXPECT_EQ(m_line.blocks(Lane::Source, 100, 2), (Blocks{{0, 100}}));
+    EXPECT_EQ(m_line.blocks(Lane::Source, 100, 3), (Blocks{{0, 10}, {10, 13, true}, {13, 100}}));
+    EXPECT_EQ(m_line.blocks(Lane::Destination, 100, 2), (Blocks{{0, 10}, {10, 12, true}, {12, 100}}));
+}
+
 TEST_F(EventTimeLineTest, ShowsAShortEventAtTheEndOfTheAxisToo)
 {
     add("00:00:00:00", "00:00:50:00", "00:00:00:00", "00:00:50:00");
@@ -257,24 +287,25 @@ RC_GTEST_FIXTURE_PROP(EventTimeLineTest, EveryColumnShowsTheTopmostEventThere, (
 
     // The painter's way: the lowest first, each over the last.
     std::vector<const TimeLineBlock*> painted(static_cast<std::size_t>(columns), nullptr);
-    std::vector<TimeLineBlock> placed;
+    std::vector<TimeLineBlock> placed[4];
     const double scale = columns / (m_line.end() - m_line.start());
-    for (const bool high : {false, true}) {
-        for (const auto& event : m_list.events()) {
-            const bool isHigh = std::find(highlighted.begin(), highlighted.end(), event) != highlighted.end();
-            if (isHigh != high)
-                continue;
-            const auto columnOf = [&](const Timecode& timecode) {
-                return static_cast<int>(std::lround((timecode.toSeconds() - m_line.start()) * scale));
-            };
-            const int width = std::min(least, columns);
-            const int first = std::min(columnOf(event->srcIn()), columns - width);
-            placed.push_back({first, std::max(columnOf(event->srcOut()), first + width), event->vfx(), isHigh});
-        }
+    for (const auto& event : m_list.events()) {
+        const bool isHigh = std::find(highlighted.begin(), highlighted.end(), event) != highlighted.end();
+        const auto columnOf = [&](const Timecode& timecode) {
+            return static_cast<int>(std::lround((timecode.toSeconds() - m_line.start()) * scale));
+        };
+        const int width = std::min(least, columns);
+        const int first = std::min(columnOf(event->srcIn()), columns - width);
+        const int end = columnOf(event->srcOut());
+        const bool isWidened = end < first + width;
+        placed[(isHigh ? 2 : 0) + (isWidened ? 1 : 0)].push_back(
+            {first, isWidened ? first + width : end, event->vfx(), isHigh});
     }
-    for (const TimeLineBlock& block : placed) {
-        for (int column = block.first; column < block.end; ++column)
-            painted[static_cast<std::size_t>(column)] = &block;
+    for (const std::vector<TimeLineBlock>& level : placed) {
+        for (const TimeLineBlock& block : level) {
+            for (int column = block.first; column < block.end; ++column)
+                painted[static_cast<std::size_t>(column)] = &block;
+        }
     }
 
     const Blocks blocks = m_line.blocks(Lane::Source, columns, least);
