@@ -57,8 +57,8 @@ fuzz:
 
 pictures:
 	@cmake/build.sh release $(picture_tests)
-	@for program in $(picture_tests); do CADREL_RENEW_PICTURES=1 build/release/bin/$$program; done
-	@git status --short tests/gui/pictures
+	@failed=0; for program in $(picture_tests); do CADREL_RENEW_PICTURES=1 build/release/bin/$$program || failed=1; done; \
+	git status --short tests/gui/pictures; exit $$failed
 
 format:
 	@cmake/install-packages.sh format

@@ -5,8 +5,24 @@
 #include <array>
 #include <charconv>
 #include <cmath>
+#include <locale>
+#include <sstream>
 
 namespace cadrel::gui {
+
+namespace {
+
+/// The number of a text that from_chars finds too large or too small: the largest, the least or nearly 0.
+double extremeOf(const std::string& text)
+{
+    std::istringstream stream(text);
+    stream.imbue(std::locale::classic());
+    double number = 0.0;
+    stream >> number;
+    return number;
+}
+
+} // namespace
 
 void NumberEntry::set(double value)
 {
@@ -15,6 +31,8 @@ void NumberEntry::set(double value)
         m_value = m_maximum;
     if (m_value < m_minimum)
         m_value = m_minimum;
+    // There is no -0.
+    m_value += 0.0;
 }
 
 void NumberEntry::setRange(double minimum, double maximum, double step)
@@ -31,7 +49,7 @@ void NumberEntry::type(const std::string& text)
     const char* const end = text.data() + text.size();
     const auto [stop, failure] = std::from_chars(text.data(), end, number);
     if (failure == std::errc::result_out_of_range)
-        set(m_maximum);
+        set(extremeOf(text));
     else
         set(failure == std::errc() && stop == end && std::isfinite(number) ? number : 0.0);
 }

@@ -15,8 +15,15 @@ constexpr const char* Digits = "0123456789";
 
 } // namespace
 
+SpinBox::Display::Display(SpinBox& owner) : Label("m_valueDisplay"), m_owner(owner) {}
+
+void SpinBox::Display::inputAttemptWhenModal()
+{
+    guardUser([this] { m_owner.endTyping(); });
+}
+
 SpinBox::SpinBox()
-    : m_valueDisplay("m_valueDisplay"), m_upButton("m_upButton", ButtonPicture::Symbol::Up),
+    : m_valueDisplay(*this), m_upButton("m_upButton", ButtonPicture::Symbol::Up),
       m_downButton("m_downButton", ButtonPicture::Symbol::Down)
 {
     setWantsKeyboardFocus(true);
@@ -33,15 +40,19 @@ SpinBox::SpinBox()
         button->addListener(this);
         addAndMakeVisible(*button);
     }
+    m_upButton.setTooltip(translatedText(L"Up"));
+    m_downButton.setTooltip(translatedText(L"Down"));
     showValue();
 }
 
 SpinBox::~SpinBox()
 {
-    // Nobody is told of what was typed, and the editor doesn't lose the focus when half of this is gone.
-    m_listeners.clear();
-    giveAwayKeyboardFocus();
-    m_valueDisplay.removeMouseListener(this);
+    guardSystem([this] {
+        // Nobody is told of what was typed, and the editor doesn't lose the focus when half of this is gone.
+        m_listeners.clear();
+        giveAwayKeyboardFocus();
+        m_valueDisplay.removeMouseListener(this);
+    });
 }
 
 void SpinBox::addListener(Listener* listener)
@@ -110,8 +121,12 @@ void SpinBox::mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWhe
 {
     guardUser([&] {
         // The label's own event comes here, too; it isn't on this component.
-        if (event.eventComponent == this && isEnabled() && wheel.deltaY != 0.0F)
+        if (event.eventComponent != this)
+            return;
+        if (isEnabled() && wheel.deltaY != 0.0F)
             step(wheel.deltaY > 0.0F);
+        else
+            Component::mouseWheelMove(event, wheel);
     });
 }
 
@@ -123,6 +138,12 @@ bool SpinBox::keyPressed(const juce::KeyPress& key)
         if (isUp || key == juce::KeyPress(juce::KeyPress::downKey)) {
             isUsed = true;
             step(isUp);
+        } else if (m_valueDisplay.isBeingEdited() && key == juce::KeyPress(juce::KeyPress::returnKey)) {
+            isUsed = true;
+            endTyping();
+        } else if (m_valueDisplay.isBeingEdited() && key == juce::KeyPress(juce::KeyPress::escapeKey)) {
+            isUsed = true;
+            showValue();
         } else if (juce::String(Digits).containsChar(key.getTextCharacter())) {
             openEditor();
             if (juce::TextEditor* const editor = m_valueDisplay.getCurrentTextEditor())
@@ -132,41 +153,45 @@ bool SpinBox::keyPressed(const juce::KeyPress& key)
     return isUsed;
 }
 
+void SpinBox::enablementChanged()
+{
+    guardSystem([this] {
+        // JUCE doesn't expect that a listener deletes the input meanwhile, so nobody is told.
+        if (!isEnabled() && m_valueDisplay.isBeingEdited())
+            showValue();
+    });
+}
+
 void SpinBox::focusGained(FocusChangeType)
 {
-    repaint();
+    guardSystem([this] { repaint(); });
 }
 
 void SpinBox::focusLost(FocusChangeType)
 {
-    repaint();
+    guardSystem([this] { repaint(); });
 }
 
 void SpinBox::focusOfChildComponentChanged(FocusChangeType)
 {
     guardUser([&] {
         if (m_valueDisplay.isBeingEdited() && !m_valueDisplay.hasKeyboardFocus(true))
-            m_valueDisplay.hideEditor(false);
+            endTyping();
     });
 }
 
-void SpinBox::labelTextChanged(juce::Label*)
+void SpinBox::labelTextChanged(juce::Label* label)
 {
     guardUser([&] {
-        m_entry.type(m_typed);
+        m_entry.type(label->getText().toStdString());
         showValue();
         tell();
     });
 }
 
-void SpinBox::editorHidden(juce::Label*, juce::TextEditor& editor)
+void SpinBox::editorHidden(juce::Label*, juce::TextEditor&)
 {
-    guardUser([&] {
-        // The label tells afterwards whether the text is another one. Only then may the input be deleted.
-        m_typed = editor.getText().toStdString();
-        m_valueDisplay.setEditable(false);
-        showValue();
-    });
+    guardSystem([this] { m_valueDisplay.setEditable(false); });
 }
 
 void SpinBox::buttonClicked(juce::Button* button)
@@ -183,6 +208,8 @@ void SpinBox::openEditor()
     m_valueDisplay.showEditor();
     if (juce::TextEditor* const editor = m_valueDisplay.getCurrentTextEditor()) {
         editor->setInputRestrictions(0, Digits);
+        // They come here, at once and whatever the text is.
+        editor->setEscapeAndReturnKeysConsumed(false);
         // Where the label has its text.
         editor->setJustification(juce::Justification::centredLeft);
         editor->setBorder(m_valueDisplay.getBorderSize());
@@ -190,12 +217,26 @@ void SpinBox::openEditor()
     }
 }
 
+bool SpinBox::take()
+{
+    const juce::TextEditor* const editor = m_valueDisplay.getCurrentTextEditor();
+    if (!editor)
+        return false;
+    m_entry.type(editor->getText().toStdString());
+    // It closes the editor.
+    showValue();
+    return true;
+}
+
+void SpinBox::endTyping()
+{
+    if (take())
+        tell();
+}
+
 void SpinBox::step(bool isUp)
 {
-    const SafePointer<SpinBox> self(this);
-    m_valueDisplay.hideEditor(false);
-    if (!self)
-        return;
+    take();
     if (isUp)
         m_entry.stepUp();
     else

@@ -7,11 +7,10 @@
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
-#include <string>
-
 namespace cadrel::gui {
 
-/// An input for a number within bounds: by two arrows, the mouse wheel, the up and down keys, or typing.
+/// An input for a number within bounds: by two arrows, the mouse wheel, the up and down keys, or typing. What is typed becomes
+/// the value when the focus leaves, on Return, and at a click elsewhere. Escape drops it.
 class SpinBox : public juce::Component, public juce::Label::Listener, public juce::Button::Listener {
 public:
     class Listener {
@@ -43,6 +42,8 @@ public:
     void mouseDown(const juce::MouseEvent& event) override;
     void mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel) override;
     bool keyPressed(const juce::KeyPress& key) override;
+    /// What was typed is dropped when the input is disabled.
+    void enablementChanged() override;
     void focusGained(FocusChangeType cause) override;
     void focusLost(FocusChangeType cause) override;
     void focusOfChildComponentChanged(FocusChangeType cause) override;
@@ -51,7 +52,23 @@ public:
     void buttonClicked(juce::Button* button) override;
 
 private:
+    /// Shows the number.
+    class Display : public juce::Label {
+    public:
+        explicit Display(SpinBox& owner);
+
+        /// A click elsewhere ends the typing.
+        void inputAttemptWhenModal() override;
+
+    private:
+        SpinBox& m_owner;
+    };
+
     void openEditor();
+    /// Closes the editor and takes what was typed. False when no editor was open.
+    bool take();
+    /// Takes what was typed and tells of it, even if the value is the same.
+    void endTyping();
     void step(bool isUp);
     void showValue();
     /// Nothing of the input may be touched afterwards.
@@ -60,10 +77,9 @@ private:
     NumberEntry m_entry;
     juce::ListenerList<Listener> m_listeners;
     juce::Colour m_backgroundColour = juce::Colours::black;
-    juce::Label m_valueDisplay;
+    Display m_valueDisplay;
     PictureButton m_upButton;
     PictureButton m_downButton;
-    std::string m_typed; ///< what the editor held when it was hidden
 };
 
 } // namespace cadrel::gui

@@ -15,20 +15,22 @@ namespace {
 
 constexpr int FieldHeight = 22;
 constexpr int Digits = 2;
+constexpr const char* DigitLetters = "0123456789";
 
 struct Place {
     const char* name;
+    const wchar_t* title; ///< for screen readers
     int x;
     int width;
 };
 constexpr std::array<Place, TimecodeEntry::FieldCount> FieldPlaces = {{
-    {"Hours Edit", 14, 24},
-    {"Minutes Edit", 34, 24},
-    {"Seconds Edit", 54, 24},
-    {"FramesEdit", 74, 24},
+    {"Hours Edit", L"Hours", 14, 24},
+    {"Minutes Edit", L"Minutes", 34, 24},
+    {"Seconds Edit", L"Seconds", 54, 24},
+    {"FramesEdit", L"Frames", 74, 24},
 }};
-constexpr Place SignPlace = {"Sign", 0, 15};
-constexpr std::array<Place, 3> ColonPlaces = {{{"", 71, 10}, {"", 51, 10}, {"", 31, 10}}};
+constexpr Place SignPlace = {"Sign", L"Sign", 0, 15};
+constexpr std::array<Place, 3> ColonPlaces = {{{"", L"", 71, 10}, {"", L"", 51, 10}, {"", L"", 31, 10}}};
 
 void setUp(juce::TextEditor& editor, bool isEditable)
 {
@@ -49,12 +51,13 @@ void setUp(juce::TextEditor& editor, bool isEditable)
 
 } // namespace
 
-/// Tells its input of each key after it has worked, and leaves Return and Escape to it. It tells at once: JUCE itself tells of
-/// changes later, and by then the next digit would have gone to the wrong field.
+/// Tells its input of each change by the user after it was made, and leaves Return and Escape to it. It tells at once: JUCE
+/// itself tells of changes later, and by then the next digit would have gone to the wrong field.
 class TcInput::Editor : public juce::TextEditor {
 public:
-    Editor(TcInput& owner, const char* name) : TextEditor(name), m_owner(owner)
+    Editor(TcInput& owner, const Place& place) : TextEditor(place.name), m_owner(owner)
     {
+        setTitle(translatedText(place.title));
         setUp(*this, true);
         setEscapeAndReturnKeysConsumed(false);
     }
@@ -64,15 +67,23 @@ public:
         bool isUsed = false;
         guardUser([&] {
             isUsed = m_owner.stepByKey(*this, key);
-            if (isUsed)
-                return;
-            const juce::String before = getText();
-            isUsed = TextEditor::keyPressed(key);
-            // It may delete this.
-            if (getText() != before)
-                m_owner.typed(*this);
+            if (!isUsed)
+                change([&] { isUsed = TextEditor::keyPressed(key); });
         });
         return isUsed;
+    }
+    void insertTextAtCaret(const juce::String& text) override
+    {
+        guardUser([&] {
+            change([&] {
+                m_hasDigit = m_hasDigit || text.containsAnyOf(DigitLetters);
+                TextEditor::insertTextAtCaret(text);
+            });
+        });
+    }
+    void performPopupMenuAction(int item) override
+    {
+        guardUser([&] { change([&] { TextEditor::performPopupMenuAction(item); }); });
     }
     void focusLost(FocusChangeType cause) override
     {
@@ -83,17 +94,38 @@ public:
     }
 
 private:
+    /// Runs what may change the text. After the outermost one the input is told, which may delete this. A digit counts even if
+    /// it leaves the text as it was.
+    template <class Change>
+    void change(Change&& run)
+    {
+        if (m_isChanging) {
+            run();
+            return;
+        }
+        const juce::String before = getText();
+        m_hasDigit = false;
+        {
+            const juce::ScopedValueSetter<bool> changing(m_isChanging, true);
+            run();
+        }
+        if (m_hasDigit || getText() != before)
+            m_owner.typed(*this);
+    }
+
     TcInput& m_owner;
+    bool m_isChanging = false;
+    bool m_hasDigit = false; ///< the change has brought one
 };
 
 TcInput::TcInput(bool isSigned) : m_entry(isSigned)
 {
     for (std::size_t field = m_fields.size(); field-- > 0;) {
-        m_fields[field] = std::make_unique<Editor>(*this, FieldPlaces[field].name);
-        m_fields[field]->setInputRestrictions(Digits, "0123456789");
+        m_fields[field] = std::make_unique<Editor>(*this, FieldPlaces[field]);
+        m_fields[field]->setInputRestrictions(Digits, DigitLetters);
         addAndMakeVisible(*m_fields[field]);
     }
-    m_sign = std::make_unique<Editor>(*this, SignPlace.name);
+    m_sign = std::make_unique<Editor>(*this, SignPlace);
     m_sign->setInputRestrictions(1, "+-");
     m_sign->setColour(juce::CaretComponent::caretColourId, juce::Colours::black);
     addChildComponent(*m_sign);
@@ -115,9 +147,11 @@ TcInput::TcInput(bool isSigned) : m_entry(isSigned)
 
 TcInput::~TcInput()
 {
-    // Nobody is told of what was typed, and no editor loses the focus when half of this is gone.
-    m_listeners.clear();
-    giveAwayKeyboardFocus();
+    guardSystem([this] {
+        // Nobody is told of what was typed, and no editor loses the focus when half of this is gone.
+        m_listeners.clear();
+        giveAwayKeyboardFocus();
+    });
 }
 
 void TcInput::addListener(Listener* listener)
@@ -141,15 +175,32 @@ void TcInput::setValue(const core::Timecode& timecode, juce::NotificationType no
 
 void TcInput::setActive(bool isActive)
 {
-    setEnabled(isActive);
+    // JUCE doesn't expect that a listener deletes the input while it is being disabled.
+    const SafePointer<TcInput> self(this);
+    if (!isActive && hasKeyboardFocus(true)) {
+        if (getParentComponent())
+            getParentComponent()->grabKeyboardFocus();
+        if (self)
+            giveAwayKeyboardFocus();
+    }
+    if (self)
+        setEnabled(isActive);
 }
 
 void TcInput::enablementChanged()
 {
-    guardSystem([this] {
-        m_disableOverlay.setVisible(!isEnabled());
-        m_disableOverlay.toFront(false);
-    });
+    guardSystem([this] { cover(); });
+}
+
+void TcInput::parentHierarchyChanged()
+{
+    guardSystem([this] { cover(); });
+}
+
+void TcInput::cover()
+{
+    m_disableOverlay.setVisible(!isEnabled());
+    m_disableOverlay.toFront(false);
 }
 
 void TcInput::setBackgroundColour(juce::Colour colour)
@@ -182,13 +233,12 @@ void TcInput::resized()
 void TcInput::mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel)
 {
     guardUser([&] {
-        if (!isEnabled() || !hasKeyboardFocus(true)) {
-            Component::mouseWheelMove(event, wheel);
-            return;
-        }
         auto* const editor = dynamic_cast<Editor*>(getComponentAt(event.getPosition()));
-        if (editor && wheel.deltaY != 0.0F)
+        // Only an enabled input has the focus.
+        if (editor && hasKeyboardFocus(true) && wheel.deltaY != 0.0F)
             step(*editor, wheel.deltaY > 0.0F);
+        else
+            Component::mouseWheelMove(event, wheel);
     });
 }
 

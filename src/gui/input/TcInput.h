@@ -40,7 +40,7 @@ public:
     const core::Timecode& getValue() const { return m_entry.value(); }
     bool isPositive() const { return m_entry.isPositive(); }
 
-    /// An input that isn't active is covered and disabled.
+    /// An input that isn't active is covered and disabled. What was typed is taken before.
     void setActive(bool isActive);
     void setBackgroundColour(juce::Colour colour);
 
@@ -48,6 +48,7 @@ public:
     void resized() override;
     /// The input is covered also when what it lies on is disabled.
     void enablementChanged() override;
+    void parentHierarchyChanged() override;
     /// Steps the field under the mouse, or flips the sign, when the input has the focus.
     void mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel) override;
     bool keyPressed(const juce::KeyPress& key) override;
@@ -57,7 +58,9 @@ private:
     /// One of the editors that are typed into.
     class Editor;
 
-    /// What was typed by the key.
+    /// Covers the input while it is disabled.
+    void cover();
+    /// What was typed, pasted or undone.
     void typed(Editor& editor);
     bool stepByKey(Editor& editor, const juce::KeyPress& key);
     void step(Editor& editor, bool isUp);

@@ -2,6 +2,7 @@
 
 #include "gui/look/LookAndFeel.h"
 
+#include "gui/guard/Guard.h"
 #include "gui/look/EmbeddedFonts.h"
 #include "gui/look/Text.h"
 
@@ -28,9 +29,11 @@ LookAndFeel::LookAndFeel() : m_regular(typefaceOf(embedded::RegularFont)), m_bol
 
 LookAndFeel::~LookAndFeel()
 {
-    if (&getDefaultLookAndFeel() == this)
-        setDefaultLookAndFeel(nullptr);
-    juce::Typeface::clearTypefaceCache();
+    guardSystem([this] {
+        if (&getDefaultLookAndFeel() == this)
+            setDefaultLookAndFeel(nullptr);
+        juce::Typeface::clearTypefaceCache();
+    });
 }
 
 juce::Typeface::Ptr LookAndFeel::getTypefaceForFont(const juce::Font& font)

@@ -11,6 +11,9 @@ namespace cadrel::gui {
 /// How the controls of the window look. While it lives it is the default of the process, so that popups and tooltips have it
 /// too. Each window holds one `juce::SharedResourcePointer<LookAndFeel>`: all share one look and feel, which goes with the
 /// last of them.
+///
+/// JUCE calls all of these. What draws drops its failures. What answers has none: the fonts are those of the table, the
+/// typefaces are there since the start, and a tick is a few lines.
 class LookAndFeel : public juce::LookAndFeel_V2 {
 public:
     LookAndFeel();

@@ -18,7 +18,7 @@ constexpr float MenuFontHeight = 16.0F;
 constexpr float BlockShare = 0.25F;
 constexpr unsigned BlockPeriod = 1500;
 /// The free space that a sort arrow takes at the end of a header.
-constexpr float SortArrow = 12.0F;
+constexpr float SortArrow = 16.0F;
 
 /// The part of a progress bar that is filled: up to the progress, or a moving block when nobody knows it.
 juce::Rectangle<float> doneOf(juce::Rectangle<float> bar, double progress)
@@ -195,7 +195,7 @@ void LookAndFeel::drawTextEditorOutline(juce::Graphics& graphics, int width, int
 
 void LookAndFeel::drawTableHeaderBackground(juce::Graphics& graphics, juce::TableHeaderComponent&)
 {
-    graphics.fillAll(toColour(Palette::panel));
+    guardSystem([&] { graphics.fillAll(toColour(Palette::panel)); });
 }
 
 void LookAndFeel::drawTableHeaderColumn(juce::Graphics& graphics, juce::TableHeaderComponent&, const juce::String& name,

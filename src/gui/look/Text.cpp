@@ -3,6 +3,7 @@
 #include "gui/look/Text.h"
 
 #include "gui/look/FontTable.h"
+#include "gui/look/ShownText.h"
 #include "gui/look/TextShortening.h"
 
 #include <string>
@@ -31,11 +32,18 @@ double widthOf(const juce::String& text, const juce::Font& font)
     return layout.getWidth();
 }
 
+/// Whatever the width of a text depends on. JUCE's own name of a font rounds its height and leaves out how it is stretched.
+juce::String keyOf(const juce::Font& font)
+{
+    return font.toString() + ' ' + juce::String(font.getHeight()) + ' ' + juce::String(font.getHorizontalScale()) +
+           ' ' + juce::String(font.getExtraKerningFactor());
+}
+
 juce::String shortened(const juce::String& text, double boxWidth, const juce::Font& font)
 {
     const juce::SharedResourcePointer<TextShortening> shortening;
     const auto measure = [&font](const std::wstring& part) { return widthOf(juce::String(part.c_str()), font); };
-    const std::wstring fontKey = font.toString().toWideCharPointer();
+    const std::wstring fontKey = keyOf(font).toWideCharPointer();
     return shortening->cutOnce(text.toWideCharPointer(), boxWidth, fontKey, measure).c_str();
 }
 
@@ -45,6 +53,11 @@ juce::Font getFont(int index)
 {
     const FontStyle style = fontStyle(index);
     return {FontFamily, style.height, style.isBold ? juce::Font::bold : juce::Font::plain};
+}
+
+juce::String translatedText(const std::wstring& text)
+{
+    return translated(text).c_str();
 }
 
 void drawText(juce::Graphics& graphics, const juce::String& text, float x, float y, float width, float height,

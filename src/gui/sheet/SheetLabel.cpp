@@ -2,15 +2,9 @@
 
 #include "gui/sheet/SheetLabel.h"
 
-#include "gui/look/ShownText.h"
 #include "gui/look/Text.h"
 
 namespace cadrel::gui {
-
-juce::String translatedText(const std::wstring& text)
-{
-    return translated(text).c_str();
-}
 
 SheetLabel::SheetLabel(const juce::String& name, const std::wstring& label, int fontIndex)
     : Label(name, translatedText(label))

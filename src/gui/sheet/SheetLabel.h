@@ -8,9 +8,6 @@
 
 namespace cadrel::gui {
 
-/// The text in the user's language, as JUCE takes it; the text itself where it can't be translated.
-juce::String translatedText(const std::wstring& text);
-
 /// A text on the panel of a sheet: black, in one line, at the left.
 class SheetLabel : public juce::Label {
 public:

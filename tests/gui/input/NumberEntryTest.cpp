@@ -123,6 +123,36 @@ TEST(NumberEntry, ReadsMoreDigitsThanANumberHoldsAsTheMaximum)
     EXPECT_EQ(entry.value(), 20.0);
 }
 
+TEST(NumberEntry, ReadsWhatIsTooSmallForANumberAsZero)
+{
+    NumberEntry entry;
+    entry.set(15.0);
+
+    entry.type("0." + std::string(400, '0') + "1");
+
+    EXPECT_EQ(entry.value(), 0.0);
+}
+
+TEST(NumberEntry, ReadsMoreDigitsThanANumberHoldsAsTheMinimumWhereItIsNegative)
+{
+    NumberEntry entry;
+    entry.setRange(-5.0, 5.0, 1.0);
+
+    entry.type('-' + std::string(400, '9'));
+
+    EXPECT_EQ(entry.value(), -5.0);
+}
+
+TEST(NumberEntry, ShowsNoNegativeZero)
+{
+    NumberEntry entry;
+    entry.setRange(-5.0, 5.0, 1.0);
+
+    entry.type("-0");
+
+    EXPECT_EQ(entry.number(), "0");
+}
+
 TEST(NumberEntry, ShowsTheNumberFollowedByItsSuffix)
 {
     NumberEntry entry;

@@ -33,6 +33,14 @@ public:
 
 using Heard = std::vector<double>;
 
+/// Counts the turns of the wheel that go on to it.
+class SheetBeneath : public juce::Component {
+public:
+    void mouseWheelMove(const juce::MouseEvent&, const juce::MouseWheelDetails&) override { ++wheels; }
+
+    int wheels = 0;
+};
+
 class SpinBoxTest : public testing::Test {
 protected:
     SpinBoxTest() { open(); }
@@ -47,6 +55,8 @@ protected:
         spinBox->addListener(&listener);
         other.setBounds(20, 100, 100, 22);
         window.show(other);
+        beneath.setBounds(0, 0, 300, 80);
+        window.show(beneath);
         window.show(*spinBox);
     }
 
@@ -66,6 +76,7 @@ protected:
     RecordingAlerts alerts;
     WindowOnScreen window;
     juce::TextEditor other{"other"};
+    SheetBeneath beneath;
     Listener listener;
     std::unique_ptr<SpinBox> spinBox;
 };
@@ -140,16 +151,47 @@ TEST_F(SpinBoxTest, StepsByTheUpAndDownKeys)
     EXPECT_EQ(listener.heard, (Heard{55.0, 50.0}));
 }
 
+TEST_F(SpinBoxTest, HasArrowsThatScreenReadersCanTellApart)
+{
+    EXPECT_EQ(up().getTitle(), "Up");
+    EXPECT_EQ(down().getTitle(), "Down");
+}
+
 TEST_F(SpinBoxTest, IgnoresEverythingWhileItIsDisabled)
 {
     spinBox->setEnabled(false);
 
-    window.wheel(display(), 1.0F);
     window.click(display());
     window.click(up());
 
     EXPECT_TRUE(listener.heard.empty());
     EXPECT_FALSE(display().isBeingEdited());
+}
+
+TEST_F(SpinBoxTest, LeavesTheWheelToTheSheetWhileItIsDisabled)
+{
+    beneath.addAndMakeVisible(*spinBox);
+    // Its middle lies between the number and the arrows.
+    spinBox->setSize(40, 20);
+    window.wheel(*spinBox, 1.0F);
+    ASSERT_EQ(listener.heard, Heard{55.0});
+
+    spinBox->setEnabled(false);
+    window.wheel(*spinBox, 1.0F);
+    window.wheel(display(), 1.0F);
+
+    EXPECT_EQ(listener.heard.size(), 1U);
+    EXPECT_EQ(beneath.wheels, 2);
+}
+
+TEST_F(SpinBoxTest, LeavesAWheelThatOnlyGoesSidewaysToTheSheet)
+{
+    beneath.addAndMakeVisible(*spinBox);
+
+    window.wheel(display(), 0.0F);
+
+    EXPECT_TRUE(listener.heard.empty());
+    EXPECT_EQ(beneath.wheels, 1);
 }
 
 TEST_F(SpinBoxTest, OpensAnEditorForTheBareNumberAtAClick)
@@ -206,12 +248,56 @@ TEST_F(SpinBoxTest, RestoresTheNumberOnEscape)
     EXPECT_EQ(shown(), "50%");
 }
 
-TEST_F(SpinBoxTest, ShowsTheSuffixAgainWhenTheSameNumberIsTyped)
+TEST_F(SpinBoxTest, TellsOfTheSameNumberAlikeOnEachRoadAndWithEachSuffix)
 {
-    edit("50");
-    window.press(juce::KeyPress::returnKey);
+    const std::vector<std::function<void()>> roads = {
+        [&] { window.press(juce::KeyPress::returnKey); },
+        [&] { window.click(other); },
+        [&] {
+            other.grabKeyboardFocus();
+            window.serve();
+        },
+    };
+    for (const char* const suffix : {"%", " frames", ""}) {
+        spinBox->setSuffix(suffix);
+        for (std::size_t road = 0; road < roads.size(); ++road) {
+            listener.heard.clear();
+            edit("50");
 
-    EXPECT_FALSE(display().isEditable());
+            roads[road]();
+
+            EXPECT_EQ(listener.heard, Heard{50.0}) << suffix << road;
+            EXPECT_FALSE(display().isEditable()) << suffix << road;
+            EXPECT_EQ(shown(), std::string("50") + suffix) << road;
+        }
+    }
+}
+
+TEST_F(SpinBoxTest, TellsNobodyOfTheSameNumberAtEscape)
+{
+    for (const char* const suffix : {"%", ""}) {
+        spinBox->setSuffix(suffix);
+        edit("50");
+
+        window.press(juce::KeyPress::escapeKey);
+
+        EXPECT_FALSE(display().isEditable()) << suffix;
+        EXPECT_EQ(shown(), std::string("50") + suffix);
+    }
+    EXPECT_TRUE(listener.heard.empty());
+}
+
+TEST_F(SpinBoxTest, DropsWhatWasTypedWhenItIsDisabled)
+{
+    edit("25");
+    listener.meanwhile = [&] { spinBox.reset(); };
+
+    spinBox->setEnabled(false);
+    window.serve();
+
+    ASSERT_NE(spinBox, nullptr);
+    EXPECT_FALSE(display().isBeingEdited());
+    EXPECT_TRUE(listener.heard.empty());
     EXPECT_EQ(shown(), "50%");
 }
 
@@ -243,14 +329,35 @@ TEST_F(SpinBoxTest, OpensTheEditorWithTheDigitThatIsTyped)
     EXPECT_EQ(listener.heard, Heard{15.0});
 }
 
-TEST_F(SpinBoxTest, StepsFromWhatWasTyped)
+TEST_F(SpinBoxTest, StepsFromWhatWasTypedAndTellsOnce)
 {
-    edit("20");
+    for (const char* const suffix : {"%", ""}) {
+        spinBox->setSuffix(suffix);
+        listener.heard.clear();
+        edit("20");
 
-    window.wheel(display(), 1.0F);
+        window.wheel(display(), 1.0F);
 
-    EXPECT_EQ(listener.heard.back(), 25.0);
-    EXPECT_EQ(shown(), "25%");
+        EXPECT_EQ(listener.heard, Heard{25.0});
+        EXPECT_EQ(shown(), std::string("25") + suffix);
+    }
+}
+
+TEST_F(SpinBoxTest, StepsOnceFromAnEditorThatNobodyHasTypedInto)
+{
+    for (const char* const suffix : {"%", ""}) {
+        spinBox->setSuffix(suffix);
+        spinBox->setValue(50.0, juce::dontSendNotification);
+        listener.heard.clear();
+        window.click(display());
+        window.wheel(display(), -1.0F);
+        EXPECT_EQ(listener.heard, Heard{45.0});
+
+        window.click(display());
+        window.click(up());
+        // The click ends the typing first.
+        EXPECT_EQ(listener.heard, (Heard{45.0, 45.0, 50.0}));
+    }
 }
 
 TEST_F(SpinBoxTest, IsEditedAgainAfterEachRoad)
@@ -280,6 +387,22 @@ TEST_F(SpinBoxTest, TellsTheLastListenerFirst)
     EXPECT_EQ(order, (std::vector<int>{2, 1}));
 }
 
+TEST_F(SpinBoxTest, TellsTheOthersWhenAListenerRemovesItself)
+{
+    Listener leaving;
+    leaving.meanwhile = [&] { spinBox->removeListener(&leaving); };
+    spinBox->addListener(&leaving);
+    Listener last;
+    spinBox->addListener(&last);
+
+    spinBox->setValue(10.0, juce::sendNotification);
+    spinBox->setValue(15.0, juce::sendNotification);
+
+    EXPECT_EQ(last.heard, (Heard{10.0, 15.0}));
+    EXPECT_EQ(leaving.heard, Heard{10.0});
+    EXPECT_EQ(listener.heard, (Heard{10.0, 15.0}));
+}
+
 TEST_F(SpinBoxTest, TellsNobodyOfWhatWasTypedWhenItGoes)
 {
     edit("25");
@@ -306,6 +429,10 @@ TEST_F(SpinBoxTest, MayBeDeletedByAListenerOnEveryRoad)
             edit("25");
             other.grabKeyboardFocus();
             window.serve();
+        },
+        [&] {
+            edit("25");
+            window.click(other);
         },
         [&] {
             edit("25");

@@ -199,6 +199,81 @@ TEST_F(TcInputTest, IsTypedFromTheLeftOverNumbersThatDropFrameLeavesOut)
     EXPECT_EQ(listener.heard, Heard{"+00:01:00:02"});
 }
 
+TEST_F(TcInputTest, TakesWhatIsPastedFromTheMenuAsItTakesWhatIsTyped)
+{
+    open(false);
+    juce::SystemClipboard::copyTextToClipboard("12");
+    focus(seconds());
+
+    seconds().performPopupMenuAction(juce::StandardApplicationCommandIDs::paste);
+    EXPECT_EQ(focused(), "FramesEdit");
+    EXPECT_TRUE(listener.heard.empty());
+    frames().performPopupMenuAction(juce::StandardApplicationCommandIDs::paste);
+
+    EXPECT_EQ(listener.heard, Heard{"+00:00:12:12"});
+    EXPECT_EQ(frames().getHighlightedText(), "12");
+}
+
+TEST_F(TcInputTest, GoesOnWhenTheMenuTakesADigitBack)
+{
+    open(false);
+    focus(minutes());
+    window.type("1");
+    ASSERT_EQ(minutes().getText(), "1");
+
+    minutes().performPopupMenuAction(juce::StandardApplicationCommandIDs::undo);
+
+    EXPECT_EQ(minutes().getText(), "00");
+    EXPECT_EQ(focused(), "Seconds Edit");
+}
+
+TEST_F(TcInputTest, TakesWhatAnInputMethodWrites)
+{
+    open(false);
+    focus(frames());
+
+    dynamic_cast<juce::TextInputTarget&>(frames()).insertTextAtCaret("07");
+
+    EXPECT_EQ(listener.heard, Heard{"+00:00:00:07"});
+}
+
+TEST_F(TcInputTest, GoesOnAfterADigitThatLeavesTheTextAsItWas)
+{
+    open(false);
+    input->setValue(Timecode(0, 12, 0, 0), juce::dontSendNotification);
+    focus(minutes());
+    minutes().setHighlightedRegion({1, 2});
+
+    window.type("2");
+
+    EXPECT_EQ(minutes().getText(), "12");
+    EXPECT_EQ(focused(), "Seconds Edit");
+}
+
+TEST_F(TcInputTest, StaysInTheFieldAfterAKeyThatBringsNoDigit)
+{
+    open(false);
+    focus(minutes());
+    minutes().setCaretPosition(0);
+
+    window.press(juce::KeyPress::backspaceKey);
+    window.type("x");
+
+    EXPECT_EQ(minutes().getText(), "00");
+    EXPECT_EQ(focused(), "Minutes Edit");
+}
+
+TEST_F(TcInputTest, HasTitlesThatScreenReadersRead)
+{
+    open(true);
+
+    EXPECT_EQ(hours().getTitle(), "Hours");
+    EXPECT_EQ(minutes().getTitle(), "Minutes");
+    EXPECT_EQ(seconds().getTitle(), "Seconds");
+    EXPECT_EQ(frames().getTitle(), "Frames");
+    EXPECT_EQ(sign().getTitle(), "Sign");
+}
+
 TEST_F(TcInputTest, KeepsEachDigitWhenTheyComeFast)
 {
     open(false);
@@ -439,6 +514,7 @@ TEST_F(TcInputTest, IgnoresTheWheelAndIsCoveredWhileItIsNotActive)
     EXPECT_FALSE(input->isEnabled());
     window.wheel(frames(), 1.0F);
     EXPECT_EQ(shown(), "+00:00:00:00");
+    EXPECT_EQ(sheet.wheels, 1);
 
     input->setActive(true);
     EXPECT_FALSE(overlay.isVisible());
@@ -454,6 +530,60 @@ TEST_F(TcInputTest, IsCoveredAlsoWhenWhatItLiesOnIsDisabled)
     EXPECT_TRUE(overlay.isVisible());
     input->getParentComponent()->setEnabled(true);
     EXPECT_FALSE(overlay.isVisible());
+}
+
+TEST_F(TcInputTest, IsCoveredWhenItIsPutOnSomethingDisabled)
+{
+    juce::Component disabled;
+    disabled.setEnabled(false);
+    TcInput added(false);
+    const juce::Component& overlay = *added.getChildComponent(added.getNumChildComponents() - 1);
+
+    disabled.addAndMakeVisible(added);
+    EXPECT_TRUE(overlay.isVisible());
+    disabled.removeChildComponent(&added);
+    EXPECT_FALSE(overlay.isVisible());
+}
+
+TEST_F(TcInputTest, LeavesAWheelThatStepsNothingToTheSheet)
+{
+    open(false);
+    focus(frames());
+
+    window.wheel(frames(), 0.0F);
+
+    EXPECT_EQ(shown(), "+00:00:00:00");
+    EXPECT_EQ(sheet.wheels, 1);
+}
+
+TEST_F(TcInputTest, TellsTheOthersWhenAListenerRemovesItself)
+{
+    open(false);
+    Listener leaving;
+    leaving.meanwhile = [&] { input->removeListener(&leaving); };
+    input->addListener(&leaving);
+    Listener last;
+    input->addListener(&last);
+
+    input->setValue(Timecode(1, 0, 0, 0), juce::sendNotification);
+    input->setValue(Timecode(2, 0, 0, 0), juce::sendNotification);
+
+    EXPECT_EQ(last.heard.size(), 2U);
+    EXPECT_EQ(leaving.heard, Heard{"+01:00:00:00"});
+    EXPECT_EQ(listener.heard.size(), 2U);
+}
+
+TEST_F(TcInputTest, TakesWhatWasTypedBeforeItIsDisabled)
+{
+    open(false);
+    focus(seconds());
+    window.type("7");
+
+    input->setActive(false);
+
+    EXPECT_EQ(listener.heard, Heard{"+00:00:07:00"});
+    EXPECT_FALSE(input->isEnabled());
+    EXPECT_FALSE(input->hasKeyboardFocus(true));
 }
 
 TEST_F(TcInputTest, TellsTheLastListenerFirstAndEachOnce)
@@ -499,6 +629,16 @@ TEST_F(TcInputTest, MayBeDeletedByAListenerOnEveryRoad)
         [&] {
             focus(frames());
             window.press(juce::KeyPress::upKey);
+        },
+        [&] {
+            focus(seconds());
+            window.type("7");
+            input->setActive(false);
+        },
+        [&] {
+            juce::SystemClipboard::copyTextToClipboard("12");
+            focus(frames());
+            frames().performPopupMenuAction(juce::StandardApplicationCommandIDs::paste);
         },
         [&] { input->setValue(Timecode(1, 0, 0, 0), juce::sendNotification); },
     };

@@ -54,14 +54,14 @@ private:
 class PicturesTest : public testing::Test {
 protected:
     /// What a test would be told that compares the square.
-    std::vector<std::string> failures()
+    std::vector<std::string> failures(const char* name = "square")
     {
         const Comparing comparing;
         testing::TestPartResultArray results;
         {
             const testing::ScopedFakeTestPartResultReporter reporter(
                 testing::ScopedFakeTestPartResultReporter::INTERCEPT_ONLY_CURRENT_THREAD, &results);
-            expectPicture(m_square, "square");
+            expectPicture(m_square, name);
         }
         std::vector<std::string> messages;
         for (int i = 0; i < results.size(); ++i)
@@ -112,4 +112,14 @@ TEST_F(PicturesTest, DifferWhereTheSizeIsAnother)
     ASSERT_EQ(messages.size(), 2U);
     EXPECT_NE(messages[0].find("10 pixels of square differ"), std::string::npos) << messages[0];
     EXPECT_NE(messages[1].find("40 pixels of square@2x differ"), std::string::npos) << messages[1];
+}
+
+TEST_F(PicturesTest, DifferWhereAComponentHasNoSize)
+{
+    m_square.setSize(0, 0);
+
+    const std::vector<std::string> messages = failures("a picture that isn't kept");
+
+    ASSERT_EQ(messages.size(), 2U);
+    EXPECT_NE(messages[0].find("has no size"), std::string::npos) << messages[0];
 }

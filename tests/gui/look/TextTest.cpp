@@ -20,12 +20,12 @@ class TextTest : public testing::Test {
 protected:
     /// Where the text has left something: white on black, with 20 free pixels around the box.
     juce::Rectangle<int> drawnIn(const juce::String& text, float boxWidth, bool shorten,
-                                 juce::Justification justification = juce::Justification::centredLeft)
+                                 juce::Justification justification = juce::Justification::centredLeft,
+                                 const juce::Font& font = getFont(5))
     {
         juce::Image image(juce::Image::RGB, 400, 60, true);
         juce::Graphics graphics(image);
-        drawText(graphics, text, 20.0F, 20.0F, boxWidth, 20.0F, justification, getFont(5), juce::Colours::white,
-                 shorten);
+        drawText(graphics, text, 20.0F, 20.0F, boxWidth, 20.0F, justification, font, juce::Colours::white, shorten);
         juce::Rectangle<int> drawn;
         for (int y = 0; y < image.getHeight(); ++y) {
             for (int x = 0; x < image.getWidth(); ++x) {
@@ -93,6 +93,20 @@ TEST_F(TextTest, CutsATextThatIsTooWideForItsBox)
     EXPECT_GT(drawnIn(name, 70.0F, true).getRight(), 20 + 70 - 20);
 }
 
+TEST_F(TextTest, CutsEachFontForItself)
+{
+    const juce::String name = "A clip name that is too long";
+    const juce::Font plain = getFont(5);
+    const auto isCut = [&](const juce::Font& font) {
+        const auto left = juce::Justification::centredLeft;
+        return drawnIn(name, 100.0F, true, left, font) != drawnIn(name, 100.0F, false, left, font);
+    };
+
+    EXPECT_TRUE(isCut(plain));
+    EXPECT_FALSE(isCut(plain.withHorizontalScale(0.5F)));
+    EXPECT_FALSE(isCut(plain.withExtraKerningFactor(-0.2F)));
+}
+
 TEST_F(TextTest, DrawsTheDotsAloneInABoxOfTenPixels)
 {
     EXPECT_EQ(drawnIn("Harbour", 10.0F, true), drawnIn("...", 100.0F, false));
@@ -107,11 +121,11 @@ TEST_F(TextTest, DrawsNothingForAnEmptyText)
 TEST_F(TextTest, DrawsALongNameWithoutDelay)
 {
     const juce::String name = juce::String::repeatedString("W", 1800);
-    drawnIn(name, 70.0F, true);
 
+    // Each box is another one, so that nothing is remembered.
     const double start = juce::Time::getMillisecondCounterHiRes();
     for (int paint = 0; paint < 20; ++paint)
-        drawnIn(name, 70.0F, true);
+        drawnIn(name, 60.0F + static_cast<float>(paint), true);
     const double onePaint = (juce::Time::getMillisecondCounterHiRes() - start) / 20.0;
 
     // A hundredth of what dropping letter after letter took.

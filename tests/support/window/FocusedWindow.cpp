@@ -2,7 +2,11 @@
 
 #include "tests/support/window/FocusedWindow.h"
 
-#include <juce_events/native/juce_linux_EventLoopInternal.h>
+#include "tests/support/window/MessagePump.h"
+
+#include <chrono>
+#include <memory>
+#include <stdexcept>
 
 namespace cadrel::tests {
 
@@ -108,13 +112,15 @@ void FocusedWindow::click(juce::Point<int> place)
 
 void FocusedWindow::pump()
 {
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
     // The last message sends others, which come after it.
     for (int round = 0; round < 3; ++round) {
         const auto isDone = std::make_shared<bool>(false);
         juce::MessageManager::callAsync([isDone] { *isDone = true; });
         while (!*isDone) {
-            for (const int descriptor : juce::LinuxEventLoopInternal::getRegisteredFds())
-                juce::LinuxEventLoopInternal::invokeEventLoopCallbackForFd(descriptor);
+            if (std::chrono::steady_clock::now() > end)
+                throw std::runtime_error("a message wasn't delivered");
+            deliverMessages();
         }
     }
 }

@@ -8,14 +8,19 @@
 
 namespace cadrel::tests {
 
+/// Delivers what is waiting now.
+inline void deliverMessages()
+{
+    for (const int descriptor : juce::LinuxEventLoopInternal::getRegisteredFds())
+        juce::LinuxEventLoopInternal::invokeEventLoopCallbackForFd(descriptor);
+}
+
 /// Delivers the messages that JUCE has put off, and those that come of them.
 inline void pumpMessages()
 {
     // A message comes of a message of a message at most.
-    for (int round = 0; round < 10; ++round) {
-        for (const int descriptor : juce::LinuxEventLoopInternal::getRegisteredFds())
-            juce::LinuxEventLoopInternal::invokeEventLoopCallbackForFd(descriptor);
-    }
+    for (int round = 0; round < 10; ++round)
+        deliverMessages();
 }
 
 } // namespace cadrel::tests

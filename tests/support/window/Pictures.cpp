@@ -76,6 +76,10 @@ juce::Image besideEachOther(const juce::Image& left, const juce::Image& middle, 
 void expectPictureAtScale(juce::Component& component, const std::string& name, float scale)
 {
     const juce::Image drawn = snapshot(component, scale);
+    if (!drawn.isValid()) {
+        ADD_FAILURE() << name << " shows nothing: its component has no size";
+        return;
+    }
     const juce::File kept(treePath("tests/gui/pictures/" + name + ".png"));
     if (isRenewing()) {
         writePicture(drawn, kept);

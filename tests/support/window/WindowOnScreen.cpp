@@ -2,7 +2,7 @@
 
 #include "tests/support/window/WindowOnScreen.h"
 
-#include <juce_events/native/juce_linux_EventLoopInternal.h>
+#include "tests/support/window/MessagePump.h"
 
 #include <chrono>
 #include <stdexcept>
@@ -81,10 +81,7 @@ void WindowOnScreen::wheel(juce::Component& component, float deltaY)
 
 void WindowOnScreen::serve()
 {
-    for (int round = 0; round < 5; ++round) {
-        for (const int descriptor : juce::LinuxEventLoopInternal::getRegisteredFds())
-            juce::LinuxEventLoopInternal::invokeEventLoopCallbackForFd(descriptor);
-    }
+    pumpMessages();
 }
 
 bool WindowOnScreen::serveUntil(const std::function<bool()>& condition)
