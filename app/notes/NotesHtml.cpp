@@ -154,12 +154,18 @@ private:
                number(m_words.change(totals.after - totals.before), "change of length") +
                number(time(totals.lifted), "lifted") + number(time(totals.inserted), "inserted") +
                number(time(totals.moved), "moved") + number(time(totals.doubled), "doubled") + "</ul>\n");
-        if (m_document.sound == nullptr)
-            return;
-        m_sink("<p class=\"dim\">Sound: ");
+        if (m_document.sound != nullptr)
+            writeLines("Sound: ", SoundWording(*m_document.sound).totals());
+        writeLines("", m_words.settings());
+        m_sink(concatenated({"<p>", NotesWording::Order, "</p>\n"}));
+    }
+
+    void writeLines(const std::string& title, const std::vector<std::string>& lines)
+    {
+        m_sink("<p class=\"dim\">" + title);
         const char* separator = "";
-        for (const std::string& total : SoundWording(*m_document.sound).totals()) {
-            m_sink(separator + escaped(total));
+        for (const std::string& line : lines) {
+            m_sink(separator + escaped(line));
             separator = "<br>";
         }
         m_sink("</p>\n");

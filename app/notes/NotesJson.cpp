@@ -262,6 +262,8 @@ private:
         if (change.inNew)
             json["new"] = {{"in", m_words.plainTimecode(m_document.notes.newTimecode(change.inNew->start))},
                            {"frames", change.inNew->length}};
+        if (const std::optional<core::Timecode> source = m_document.notes.sourceOf(change))
+            json["sourceIn"] = source->toString();
         if (change.shots > 1)
             json["shots"] = change.shots;
         if (change.isPart)

@@ -125,10 +125,13 @@ private:
         addText(concatenated({time(totals.lifted), " lifted, ", time(totals.inserted), " inserted, ",
                               time(totals.moved), " moved, ", time(totals.doubled), " doubled"}),
                 BodyFont, Ink, 13);
-        if (m_document.sound == nullptr)
-            return;
-        for (const std::string& total : SoundWording(*m_document.sound).totals())
-            addText("Sound: " + total, BodyFont, Ink, 13);
+        if (m_document.sound != nullptr) {
+            for (const std::string& total : SoundWording(*m_document.sound).totals())
+                addText("Sound: " + total, BodyFont, Ink, 13);
+        }
+        for (const std::string& line : m_words.settings())
+            addText(line, BodyFont, Dim, 13);
+        addText(std::string(NotesWording::Order), BodyFont, Ink, 13);
     }
 
     double xOf(std::int32_t frame) const
@@ -349,13 +352,15 @@ private:
         return y;
     }
 
-    Lines linesOf(const NoteEntry& entry) const
+    Lines linesOf(const NoteEntry& entry)
     {
         Lines lines;
         for (const PictureChange& change : entry.step()->changes) {
             const ChangeWords words = m_words.describe(change);
-            lines.emplace_back(concatenated({words.shot, ": ", words.what, words.more.empty() ? "" : ", ", words.more}),
-                               Ink);
+            const std::string text =
+                concatenated({words.shot, ": ", words.what, words.more.empty() ? "" : ", ", words.more});
+            for (const std::string& line : m_pages.wrapped(text, SmallFont, m_right - Margin - 92))
+                lines.emplace_back(line, Ink);
         }
         if (entry.step()->joined > 1)
             lines.emplace_back(

@@ -38,21 +38,45 @@ std::string trimmedEnd(std::string line)
     return line + "\n";
 }
 
-/// Broken at blanks where it is too long; the further lines are indented.
+std::size_t widthOf(const std::string& text)
+{
+    return toPrintable(text).width;
+}
+
+/// The first characters of a text, as many as a line has room for.
+std::string firstLineOf(const std::string& text)
+{
+    const auto isInsideOfACharacter = [](char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) == 0x80U; };
+    std::size_t end = std::min(text.size(), Width);
+    for (std::size_t next = end; next < text.size() && widthOf(text.substr(0, next)) <= Width; ++next)
+        end = next;
+    while (widthOf(text.substr(0, end)) > Width)
+        --end;
+    while (end > 1 && end < text.size() && isInsideOfACharacter(text[end]))
+        --end;
+    return text.substr(0, end);
+}
+
+/// Broken at blanks where it is too long, and inside of a word that is longer than a line; the further lines are indented.
 std::string wrapped(const std::string& text, const std::string& indent)
 {
-    const auto widthOf = [](const std::string& part) { return toPrintable(part).width; };
     std::string lines;
     std::string line;
     bool hasWord = false;
     for (std::size_t start = 0; start <= text.size();) {
         const std::size_t end = std::min(text.find(' ', start), text.size());
         const std::string word = text.substr(start, end - start);
-        if (hasWord && widthOf(line) + 1 + widthOf(word) > Width) {
+        const bool fitsOnALine = indent.size() + widthOf(word) <= Width;
+        if (hasWord && fitsOnALine && widthOf(line) + 1 + widthOf(word) > Width) {
             lines += line + "\n";
             line = indent + word;
         } else {
             line.append(start == 0 ? "" : " ").append(word);
+        }
+        while (widthOf(line) > Width) {
+            const std::string first = firstLineOf(line);
+            lines += trimmedEnd(first);
+            line.replace(0, first.size(), indent);
         }
         hasWord = hasWord || !word.empty();
         start = end + 1;
@@ -69,6 +93,7 @@ public:
         sink(cuts());
         sink(figures());
         sink(soundTotals());
+        sink(concatenated({"\n", wrapped(std::string(NotesWording::Order), {})}));
         sink(largest());
         sink(reels());
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
@@ -94,9 +119,14 @@ private:
         return padded(title, 12) + text + "\n";
     }
 
+    static std::string longLine(const std::string& title, const std::string& text)
+    {
+        return wrapped(padded(title, 12) + text, std::string(12, ' '));
+    }
+
     std::string cuts() const
     {
-        return line("Old cut", m_words.cutText(false)) + line("New cut", m_words.cutText(true)) +
+        return longLine("Old cut", m_words.cutText(false)) + longLine("New cut", m_words.cutText(true)) +
                line("Frame rate", m_document.rate) + m_document.settings.text(padded("Settings", 12), Width);
     }
 
@@ -118,7 +148,7 @@ private:
             return {};
         std::string text;
         for (const std::string& total : SoundWording(*m_document.sound).totals())
-            text += wrapped(padded(text.empty() ? "Sound" : "", 12) + total, std::string(12, ' '));
+            text += longLine(text.empty() ? "Sound" : "", total);
         return text;
     }
 
@@ -173,7 +203,7 @@ private:
             const ChangeWords words = m_words.describe(change);
             text += trimmedEnd(Indent + padded(words.what, WhatWidth) + "  " + words.shot);
             if (!words.more.empty())
-                text += trimmedEnd(Indent + "  " + toPrintable(words.more, Width - Indent.size() - 2).text);
+                text += wrapped(Indent + "  " + words.more, Indent + "  ");
         }
         if (entry.step()->joined > 1)
             text += Indent + "joined from " + std::to_string(entry.step()->joined) + " trims that cancel out\n";

@@ -6,6 +6,7 @@
 #include "app/console/Wording.h"
 #include "app/edl/GenerationReport.h"
 #include "app/edl/ScreenTimecode.h"
+#include "app/settings/SettingsReport.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/MatchedName.h"
 #include "core/time/Timecode.h"
@@ -14,6 +15,7 @@
 #include <array>
 #include <cmath>
 #include <cstdlib>
+#include <sstream>
 
 namespace cadrel::app {
 
@@ -215,6 +217,17 @@ std::string NotesWording::versionName(const EventBase* shot) const
     return shot == nullptr ? std::string() : core::nameBy(m_document.matchBy, *shot);
 }
 
+/// The roll and the source of new picture; of a part of a shot that of the part.
+std::string NotesWording::materialOf(const PictureChange& change) const
+{
+    const std::optional<Timecode> source = m_document.notes.sourceOf(change);
+    if (!source)
+        return {};
+    const std::string roll = toPrintable(change.newShot->rollName(), 40).text;
+    return concatenated({roll.empty() ? "" : "roll ", roll, roll.empty() ? "source " : ", source ",
+                         onScreen(source->toString(), m_document.notes.framerate())});
+}
+
 ChangeWords NotesWording::describe(const PictureChange& change) const
 {
     const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
@@ -229,14 +242,15 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     case ChangeKind::Lifted:
         return {(change.isPart ? "part " : "lifted ") + length + oldPlace(), nameOf(change.oldShot), {}};
     case ChangeKind::Inserted: {
-        std::string more;
-        if (shot != nullptr)
-            more = "roll " + toPrintable(shot->rollName(), 40).text + ", source " +
-                   onScreen(shot->srcIn().toString(), m_document.notes.framerate());
+        std::string more = materialOf(change);
+        if (shot != nullptr && !shot->hasSpeed(1.0))
+            more += concatenated({", speed ", percent(shot->signedSpeed()), " %"});
         return {"inserted " + length, name, more};
     }
     case ChangeKind::Replaced:
-        return {"replaced " + length, name, "was " + nameOf(change.oldShot) + oldPlace()};
+        return {"replaced " + length, name,
+                concatenated({materialOf(change), change.newShot == nullptr ? "" : ", ", "was ", nameOf(change.oldShot),
+                              oldPlace()})};
     case ChangeKind::Moved: {
         const std::string more =
             change.shots > 1 ? concatenated({" and ", std::to_string(change.shots - 1), " more"}) : "";
@@ -248,7 +262,8 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
         return {"speed " + percent(change.oldShot->signedSpeed()) + " now " + percent(change.newShot->signedSpeed()) +
                     " %",
                 name,
-                {}};
+                concatenated({"was ", timecode(change.inOld->length), " long, is ", timecode(change.inNew->length),
+                              ", ", materialOf(change)})};
     case ChangeKind::VersionChanged:
         return {"was " + toPrintable(versionName(change.oldShot), 28).text,
                 toPrintable(versionName(change.newShot), MostCharactersOfAName).text,
@@ -379,6 +394,15 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
                 concatenated({isNew ? "New cut, " : "Old cut, ", counted(counts[doubt] - MostOfAKind, "further event"),
                               ": ", explanationOf(static_cast<PictureDoubt>(doubt))}));
     }
+}
+
+std::vector<std::string> NotesWording::settings() const
+{
+    std::istringstream text(m_document.settings.text("Settings: ", std::string::npos));
+    std::vector<std::string> lines;
+    for (std::string line; std::getline(text, line);)
+        lines.push_back(line.substr(line.find_first_not_of(' ')));
+    return lines;
 }
 
 std::string NotesWording::cutText(bool isNew) const

@@ -30,6 +30,11 @@ struct ChangeWords {
 /// Says in words what stands in the notes.
 class NotesWording {
 public:
+    /// How the steps are meant.
+    static constexpr std::string_view Order =
+        "The steps are carried out in order, and their places are those in the programme so far. In the lines below a "
+        "step, \"at\" is a place in the old cut.";
+
     explicit NotesWording(const NotesDocument& document) : m_document(document) {}
 
     /// Of a frame count. It begins anew after 24 hours, which a reel may reach on its way to a shorter one. Drop-frame shows
@@ -65,6 +70,8 @@ public:
     std::size_t stepsOf(std::size_t reel) const;
     /// The largest change of a step, and how many more there are: "42A-3 MAREN MCU and 2 more".
     std::string shotsOf(const core::NoteEntry& entry) const;
+    /// The settings in force, a line for each place that they are from: "Settings: command line --simplify 12".
+    std::vector<std::string> settings() const;
     /// The names of the files of a cut, its number of events and of flawed ones.
     std::string cutText(bool isNew) const;
 
@@ -78,6 +85,7 @@ public:
 
 private:
     std::string versionName(const core::EventBase* shot) const;
+    std::string materialOf(const core::PictureChange& change) const;
     std::string transitionText(const core::PictureChange& change) const;
     void addDoubts(bool isNew, std::vector<std::string>& lines) const;
     void addUnread(bool isNew, std::vector<std::string>& lines) const;

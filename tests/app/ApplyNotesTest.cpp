@@ -746,4 +746,19 @@ TEST(ApplyNotesOfTheExample, NoLineOfTheTextIsWiderThan80Columns)
     EXPECT_LE(std::count(outcome.out.begin(), outcome.out.end(), '\n'), 50);
 }
 
+TEST(ApplyNotesOfTheExample, ItsLargestChangesStandInTheDocumentsAsTheReportPrintsThem)
+{
+    const Outcome outcome = runCadrel(reel3({}));
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+
+    for (const char* const page : {"README.md", "docs/commands.md"}) {
+        const std::string text = contentOf(treePath(page));
+        const std::size_t start = text.find("The largest changes\n");
+        ASSERT_NE(start, std::string::npos) << page;
+        const std::string shown = text.substr(start, text.find("...\n", start) - start);
+        EXPECT_EQ(std::count(shown.begin(), shown.end(), '\n'), 5) << shown;
+        EXPECT_NE(outcome.out.find(shown), std::string::npos) << page << "\n" << outcome.out;
+    }
+}
+
 } // namespace

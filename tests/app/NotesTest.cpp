@@ -88,6 +88,23 @@ json reel3Json()
     return json::parse(contentOf(path));
 }
 
+/// A text with a single blank wherever there are blanks or line ends.
+std::string unbroken(const std::string& text)
+{
+    std::istringstream stream(text);
+    std::string all;
+    for (std::string word; stream >> word;)
+        all.append(all.empty() ? "" : " ").append(word);
+    return all;
+}
+
+std::string textOfPdf(const std::string& file)
+{
+    const Outcome outcome = runProgram("pdftotext", {"-layout", file, "-"});
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    return outcome.out;
+}
+
 TEST(Notes, ShowsTheStepsAsText)
 {
     const Cuts film(oldCut(), newCut());
@@ -142,7 +159,57 @@ TEST(Notes, LongNamesMakeNoLineWider)
     }
 }
 
-TEST(Notes, TheSettingsInForceStandInTheTextAndTheJsonAlone)
+TEST(Notes, LongNamesOfFilesMakeNoLineWider)
+{
+    const TempFolder folder;
+    const std::string oneWord(140, 'O');
+    const auto accents = [](int count) {
+        std::string text;
+        for (int letter = 0; letter < count; ++letter)
+            text += "\xC3\xBC"; // one letter of two bytes
+        return text;
+    };
+
+    const Outcome outcome = runCadrel(
+        {"notes", "--old", folder.write(oneWord + ".edl", oldCut()), "--new",
+         folder.write("THE SECOND CUT OF THE FILM, AS IT CAME, OF MONDAY, WITH ALL TITLES.edl", newCut()),
+         folder.write(accents(90) + ".edl", cut("001", "A009", "10:00:00:00 10:00:01:00", "02:00:00:00 02:00:01:00"))});
+
+    ASSERT_EQ(outcome.status, 0) << outcome.err;
+    // The title takes 12 columns, which leaves 68.
+    EXPECT_NE(outcome.out.find("Old cut     " + std::string(68, 'O') + "\n            " + std::string(68, 'O') +
+                               "\n            OOOO.edl: 3 events, all valid\n"),
+              std::string::npos)
+        << outcome.out;
+    EXPECT_NE(outcome.out.find("New cut     THE SECOND CUT OF THE FILM, AS IT CAME, OF MONDAY, WITH ALL\n"
+                               "            TITLES.edl, " +
+                               accents(56) + "\n            " + accents(34) + ".edl: 5 events, all valid\n"),
+              std::string::npos)
+        << outcome.out;
+    for (const std::string& line : linesOf(outcome.out))
+        EXPECT_LE(columnsOf(line), 80) << line;
+}
+
+TEST(Notes, TheSettingsAndTheOrderOfTheStepsStandInTheHeadOfThePageAndThePaper)
+{
+    const Cuts film(oldCut(), newCut());
+    const std::vector<std::string> settings{"--heal", "gaps", "--vfx", "VFX_****_v,_comp"};
+    const std::string order = "The steps are carried out in order, and their places are those in the programme so far.";
+
+    film.file(".pdf", settings);
+    const std::string paper = unbroken(textOfPdf(film.folder / "notes.pdf"));
+    const std::string page = unbroken(film.file(".html", settings));
+
+    for (const std::string& form : {paper, page}) {
+        EXPECT_NE(form.find("Settings: command line --heal gaps --vfx 'VFX_****_v,_comp'"), std::string::npos) << form;
+        EXPECT_NE(form.find("default --match roll"), std::string::npos) << form;
+        EXPECT_NE(form.find(order), std::string::npos) << form;
+        EXPECT_LT(form.find(order), form.find("The largest changes"));
+    }
+    EXPECT_NE(unbroken(film.notes().out).find(order), std::string::npos);
+}
+
+TEST(Notes, TheSettingsInForceStandInTheTextAndTheJson)
 {
     const Cuts film(oldCut(), newCut());
     const std::string page = film.folder / "notes.json";
@@ -306,20 +373,89 @@ TEST(Notes, ThePdfHasThePaperThatIsAskedFor)
     EXPECT_GT(countOf("/MediaBox [ 0 0 612 792 ]", letter), 1);
 }
 
+/// The film after a re-edit that has put a shot of that name at its end.
+Cuts withLastShot(const std::string& name)
+{
+    return {oldCut(),
+            oldCut() + cut("004", "B009", "05:00:00:00 05:00:04:00", "01:00:30:00 01:00:34:00") + clipName(name)};
+}
+
 TEST(Notes, ANameThatIsNoUtf8CantBreakThePdf)
 {
-    const Cuts film(oldCut(), newCut() + clipName("\xFF\xFE (x) \\"));
+    const Cuts film = withLastShot("\xFF\xFE (x) \\");
 
     EXPECT_TRUE(film.file(".pdf").starts_with("%PDF-"));
+    const std::string text = textOfPdf(film.folder / "notes.pdf");
+    EXPECT_NE(text.find("\xC3\xBF\xC3\xBE (x) \\"), std::string::npos) << text;
 }
 
 TEST(Notes, ANameCantBreakThePage)
 {
-    const Cuts film(oldCut(), newCut() + clipName("<script>\"&"));
+    const Cuts film = withLastShot("<script>\"&");
 
     const std::string page = film.file(".html");
 
+    EXPECT_NE(page.find("&lt;script&gt;&quot;&amp;"), std::string::npos);
     EXPECT_EQ(page.find("<script>\"&"), std::string::npos);
+}
+
+TEST(Notes, BytesOfANameThatAreNoLettersAreReplacedInTheCsv)
+{
+    const Cuts film = withLastShot("\x1B[2J\xFF");
+
+    const std::string csv = film.file(".csv");
+
+    EXPECT_NE(csv.find(",B009,?[2J\xC3\xBF,"), std::string::npos) << csv;
+    EXPECT_EQ(csv.find('\x1B'), std::string::npos);
+}
+
+TEST(Notes, APartOfAShotTellsTheSourceOfThePart)
+{
+    // A stands once in the old cut; in the new one it stands once more, and goes on for 100 frames, or 4:04.
+    const std::string shot = cut("001", "A001", "00:00:41:16 00:00:51:16", "01:00:00:00 01:00:10:00");
+    const Cuts film(shot, shot + cut("002", "A001", "00:00:41:16 00:00:55:20", "01:00:10:00 01:00:24:04"));
+
+    const std::string text = film.notes().out;
+    const json notes = json::parse(film.file(".json"));
+
+    EXPECT_NE(text.find("roll A001, source 00:00:51:16\n"), std::string::npos) << text;
+    EXPECT_EQ(text.find("source 00:00:41:16"), std::string::npos) << text;
+    std::vector<std::string> sources;
+    for (const json& row : notes.at("reels")[0].at("rows")) {
+        if (row.at("row") == "kept")
+            continue;
+        for (const json& change : row.at("changes")) {
+            if (change.contains("sourceIn"))
+                sources.push_back(change.at("sourceIn"));
+        }
+    }
+    EXPECT_EQ(sources, std::vector<std::string>{"00:00:51:16"});
+}
+
+TEST(Notes, AReplacedShotTellsItsRollAndItsSource)
+{
+    const Cuts film(oldCut(), std::regex_replace(oldCut(), std::regex("A002  V  C  11:00:00:12 11:00:10:12"),
+                                                 "B002  V  C  05:00:00:00 05:00:10:00"));
+
+    const std::string text = film.notes().out;
+
+    EXPECT_NE(text.find("      replaced 00:00:10:00               TWO\n"
+                        "        roll B002, source 05:00:00:00, was TWO at 01:00:10:00\n"),
+              std::string::npos)
+        << text;
+}
+
+TEST(Notes, ARetimedShotTellsItsLengthsItsRollAndItsSource)
+{
+    const Cuts film(oldCut(),
+                    std::regex_replace(oldCut(), std::regex("11:00:00:12 11:00:10:12"), "11:00:00:12 11:00:05:12"));
+
+    const std::string text = film.notes().out;
+
+    EXPECT_NE(text.find("      speed 100 now 50 %                 TWO\n"
+                        "        was 00:00:10:00 long, is 00:00:10:00, roll A002, source 11:00:00:12\n"),
+              std::string::npos)
+        << text;
 }
 
 TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
@@ -334,23 +470,6 @@ TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     EXPECT_EQ(countOf("old.edl, event 10 (S001): no picture", outcome.out), 5) << outcome.out;
     EXPECT_NE(outcome.out.find("Old cut, 2 further events: no picture"), std::string::npos) << outcome.out;
-}
-
-/// A text with a single blank wherever there are blanks or line ends.
-std::string unbroken(const std::string& text)
-{
-    std::istringstream stream(text);
-    std::string all;
-    for (std::string word; stream >> word;)
-        all.append(all.empty() ? "" : " ").append(word);
-    return all;
-}
-
-std::string textOfPdf(const std::string& file)
-{
-    const Outcome outcome = runProgram("pdftotext", {"-layout", file, "-"});
-    EXPECT_EQ(outcome.status, 0) << outcome.err;
-    return outcome.out;
 }
 
 /// The lines of the last block, as the JSON has them.

@@ -111,15 +111,15 @@ struct Pattern {
 std::vector<Pattern> patterns()
 {
     const Documents documents;
-    return {
-        {"list", {documents.list()}, {"parts"}, {"kind", "transition", "flaws"}},
-        {"generate", {documents.generate()}, {"parts"}, {"kind", "transition", "flaws", "from"}},
-        {"notes",
-         documents.notes(),
-         {"insertFrom", "from", "moveFrames", "oldShot", "newShot", "old", "new", "standsAt", "shots", "part", "feet"},
-         {"kind", "transition", "flaws", "action", "row", "doubt", "match", "timecode"}},
-        {"apply", documents.apply(), {"clip", "part"}, {"transition", "flaws", "from", "timecode"}},
-        {"show", documents.show(), {"clip", "sourceOffset", "events"}, {"kind", "from", "timecode"}}};
+    return {{"list", {documents.list()}, {"parts"}, {"kind", "transition", "flaws"}},
+            {"generate", {documents.generate()}, {"parts"}, {"kind", "transition", "flaws", "from"}},
+            {"notes",
+             documents.notes(),
+             {"insertFrom", "from", "moveFrames", "oldShot", "newShot", "old", "new", "sourceIn", "standsAt", "shots",
+              "part", "feet"},
+             {"kind", "transition", "flaws", "action", "row", "doubt", "match", "timecode"}},
+            {"apply", documents.apply(), {"clip", "part"}, {"transition", "flaws", "from", "timecode"}},
+            {"show", documents.show(), {"clip", "sourceOffset", "events"}, {"kind", "from", "timecode"}}};
 }
 
 /// Maps with the keys of others; the last two are attributes.

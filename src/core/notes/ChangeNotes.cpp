@@ -2,11 +2,13 @@
 
 #include "core/notes/ChangeNotes.h"
 
+#include "core/edl/EventBase.h"
 #include "core/edl/HealedEvent.h"
 #include "core/notes/KeptStretches.h"
 #include "core/notes/StepMaker.h"
 
 #include <algorithm>
+#include <cmath>
 #include <utility>
 
 namespace cadrel::core {
@@ -114,6 +116,26 @@ std::int32_t ChangeNotes::oldTimecode(std::int32_t frame) const
 std::int32_t ChangeNotes::newTimecode(std::int32_t frame) const
 {
     return m_newCut.timecodeOf(frame, m_newCut.reelAt(frame));
+}
+
+std::optional<Timecode> ChangeNotes::sourceOf(const PictureChange& change) const
+{
+    const bool isNewPicture = change.kind == ChangeKind::Inserted || change.kind == ChangeKind::Replaced ||
+                              change.kind == ChangeKind::Retimed;
+    if (!isNewPicture || change.newShot == nullptr || !change.inNew)
+        return {};
+    const EventBase& shot = *change.newShot;
+    if (!shot.isValid())
+        return shot.srcIn();
+    constexpr double Rounding = 1e-6; // a speed is no whole number of frames
+    const double speed = shot.isNormalSpeed() ? 1.0 : shot.motionSpeed();
+    const std::int32_t before = newTimecode(change.inNew->start) - shot.dstIn().toFrameCount(m_framerate);
+    const std::int32_t first = shot.firstSource().toFrameCount(m_framerate);
+    const double frame = shot.isReversed() ? first - speed * (before + change.inNew->length) : first + speed * before;
+    Timecode source;
+    source.setFrameCount(std::clamp(static_cast<std::int32_t>(std::floor(frame + Rounding)), 0, m_framerate.lastFrame),
+                         m_framerate);
+    return source;
 }
 
 HealingNotes notesOfHealing(const EventList& changeEdl)

@@ -7,6 +7,7 @@
 #include "core/notes/PictureRules.h"
 #include "core/notes/Programme.h"
 #include "core/picture/TextNumbers.h"
+#include "core/time/Timecode.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -76,6 +77,9 @@ public:
     /// Of a frame of the old or the new programme.
     std::int32_t oldTimecode(std::int32_t frame) const;
     std::int32_t newTimecode(std::int32_t frame) const;
+    /// Where the source of inserted, replaced or retimed picture begins; of a part of a shot, where that of the part does. Of
+    /// a reversed shot it is the earliest, as SRC IN is. Nothing for other changes and for a gap.
+    std::optional<Timecode> sourceOf(const PictureChange& change) const;
 
 private:
     void number();

@@ -222,8 +222,10 @@ void NotesReplay::lookAtChange(const json& change, const json& step)
                             timecodeOfFrames(oldIn()));
     } else if (kind == "inserted") {
         m_phrases.push_back("inserted " + length);
+        lookAtSource(change);
     } else if (kind == "replaced") {
         m_phrases.push_back("replaced " + length);
+        lookAtSource(change);
     } else if (kind == "moved") {
         m_phrases.push_back("moved " + length + " at " + timecodeOfFrames(oldIn()));
     } else if (kind == "doubled") {
@@ -244,10 +246,25 @@ void NotesReplay::lookAtChange(const json& change, const json& step)
         const int now = static_cast<int>(std::lround(change.at("newShot").at("speed").get<double>() * 100));
         check(was != now, "no other speed", step);
         m_phrases.push_back("speed " + std::to_string(was) + " now " + std::to_string(now) + " %");
+        lookAtSource(change);
     } else if (kind == "head-trimmed" || kind == "tail-trimmed") {
         lookAtTrim(change);
         m_phrases.push_back((kind == "head-trimmed" ? "head " : "tail ") + framesText(frames));
     }
+}
+
+/// The source that new picture begins with, in the line of its EDL.
+void NotesReplay::lookAtSource(const json& change)
+{
+    check(change.contains("sourceIn") == change.contains("newShot"), "a source without a shot", change);
+    if (!change.contains("sourceIn"))
+        return;
+    const int first = timeOf(change.at("new").at("in"));
+    const WrittenEvent& event = *m_newCut.at(m_newCut.frameAt(first)).event;
+    const double source = event.srcIn + (first - event.dstIn) * event.speed;
+    check(std::abs(timeOf(change.at("sourceIn")) - source) < (event.speed == 1.0 ? 1e-6 : 1.0),
+          "the source is " + timecodeOfFrames(static_cast<int>(source)), change);
+    m_phrases.push_back("source " + change.at("sourceIn").get<std::string>());
 }
 
 /// Of a shot between two cuts, at its own speed, the source tells what was trimmed.

@@ -52,6 +52,7 @@ private:
     void move(const nlohmann::json& step);
     void lookAtChanges(const nlohmann::json& step);
     void lookAtChange(const nlohmann::json& change, const nlohmann::json& step);
+    void lookAtSource(const nlohmann::json& change);
     void lookAtTrim(const nlohmann::json& change);
     void lookAtShot(const nlohmann::json& shot, const EdlFrames& cut);
     void lookAtResult();

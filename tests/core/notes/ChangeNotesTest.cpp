@@ -330,6 +330,55 @@ TEST_F(ChangeNotesTest, TheSecondUseOfAShotStaysTheSecondAlsoWhereItHasBecomeLon
     EXPECT_EQ(textOf(film.steps()), Texts{"-0 +10 at 180: tail 10;"});
 }
 
+/// The frames of the source that new picture begins with.
+std::vector<int> sourcesOf(const Notes& film)
+{
+    std::vector<int> sources;
+    for (const NoteStep& step : film.steps()) {
+        for (const PictureChange& change : step.changes) {
+            if (const auto source = film.notes.sourceOf(change))
+                sources.push_back(source->toFrameCount());
+        }
+    }
+    return sources;
+}
+
+TEST_F(ChangeNotesTest, TheSourceOfAPartOfAShotIsThatOfThePart)
+{
+    // 40 frames of A come once more, and the 20 after them are new.
+    EXPECT_EQ(sourcesOf(Notes(reelOf({{"A", 500, 40}}), reelOf({{"A", 500, 40}, {"A", 500, 60}}))),
+              std::vector<int>{540});
+    EXPECT_EQ(sourcesOf(Notes(reelOf({{"A", 500, 40}}), reelOf({{"A", 500, 40}, {"B", 700, 60}}))),
+              std::vector<int>{700});
+}
+
+TEST_F(ChangeNotesTest, TheSourceOfAPartGoesOnAtTheSpeedOfTheShot)
+{
+    // B plays at half speed; its first 40 frames show 20 of the source.
+    const Notes film(reelOf({{"B", 500, 40, 20}}), reelOf({{"B", 500, 40, 20}, {"B", 500, 60, 30}}));
+
+    EXPECT_EQ(sourcesOf(film), std::vector<int>{520});
+}
+
+TEST_F(ChangeNotesTest, TheSourceOfAReversedPartIsItsEarliestFrame)
+{
+    EventList oldCut = reelOf({{"A", 500, 40}});
+    EventList newCut = reelOf({{"A", 500, 40}, {"A", 480, 60}});
+    for (const EventList* const list : {&oldCut, &newCut}) {
+        for (const auto& event : list->events())
+            event->setReversed(true);
+    }
+
+    // The second A plays from 540 down to 480; what is new of it are the frames from 500 down.
+    EXPECT_EQ(sourcesOf(Notes(std::move(oldCut), std::move(newCut))), std::vector<int>{480});
+}
+
+TEST_F(ChangeNotesTest, OnlyNewPictureHasASource)
+{
+    EXPECT_EQ(sourcesOf(Notes(reelOf({{"A", 0, 100}, {"B", 0, 50}}), reelOf({{"A", 0, 80}, {"B", 0, 50}}))),
+              std::vector<int>());
+}
+
 TEST_F(ChangeNotesTest, TrimsThatCancelOutWithinSoManyFramesAreOneStep)
 {
     const EventList oldCut = reelOf({{"A", 0, 100}, {"B", 0, 40}, {"C", 10, 50}});
