@@ -240,9 +240,8 @@ std::vector<MarkerEntry> AutomationWarningDetectAlgorithm::detect(const CutList&
             const double start = markerStart(edge.time, state);
             MarkerEntry& entry =
                 warnings
-                    .try_emplace(edge.key,
-                                 MarkerEntry{start, edge.time, util::StringUtil::toUtf8(NameStart),
-                                             MarkerKind::AutomationWarning})
+                    .try_emplace(edge.key, MarkerEntry{start, edge.time, util::StringUtil::toUtf8(NameStart),
+                                                       MarkerKind::AutomationWarning})
                     .first->second;
             entry.start = std::min(entry.start, start);
             entry.end = std::max(entry.end, edge.time);

@@ -237,8 +237,14 @@ RC_GTEST_PROP(SoundNotesLaw, EachChangeOfTheSoundIsToldOnce, ())
         rc::gen::pair(rc::gen::inRange(0, 100000), rc::gen::inRange(0, 200)));
     for (const auto& [start, length] : places) {
         const SecondsRange range{start / 10.0, (start + length) / 10.0};
-        facts.changes.push_back({length % 2 == 0 ? SoundChangeKind::Split : SoundChangeKind::Doubled, 0,
-                                 std::to_string(facts.changes.size()), {}, false, range, range, std::nullopt});
+        facts.changes.push_back({length % 2 == 0 ? SoundChangeKind::Split : SoundChangeKind::Doubled,
+                                 0,
+                                 std::to_string(facts.changes.size()),
+                                 {},
+                                 false,
+                                 range,
+                                 range,
+                                 std::nullopt});
         if (length % 2 != 0)
             facts.changes.back().now = range;
     }
