@@ -419,18 +419,15 @@ void EventTableModel::edit(int id, int row)
     const Events events = getSelectedEvents();
     if (events.empty())
         return;
-    const Life life = m_life;
+    const auto mayGoOn = [this, life = Life(m_life), &events] {
+        return !life.expired() && getSelectedEvents() == events;
+    };
     EventEdits::stopPreview(m_dataModel, m_engine);
-    if (!mayGoOn(life, events))
+    if (!mayGoOn())
         return;
     EventEdits::makeUndoEntry(id);
-    if (mayGoOn(life, events))
+    if (mayGoOn())
         changeList(id, events, row);
-}
-
-bool EventTableModel::mayGoOn(const Life& life, const Events& events) const
-{
-    return !life.expired() && getSelectedEvents() == events;
 }
 
 void EventTableModel::changeList(int id, const Events& events, int row)

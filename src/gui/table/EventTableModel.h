@@ -128,8 +128,6 @@ private:
     void requestEdit(const std::shared_ptr<core::EventBase>& event, juce::Point<int> position);
     /// Carries out an edit that is allowed for the selected events. `row` is the one that was clicked or selected last.
     void edit(int id, int row);
-    /// Whether the edit may go on after a call of the host.
-    bool mayGoOn(const Life& life, const Events& events) const;
     void changeList(int id, const Events& events, int row);
     void reloadIfStale();
     void selectAfterRemoval(int row);
