@@ -70,7 +70,8 @@ TEST_F(NumberListTest, FollowsTheUndoListOfTheHost)
 TEST_F(NumberListTest, HasNothingWhereThereIsNoList)
 {
     EXPECT_FALSE(readNumbers(*node, Key));
-    for (const FVariant& value : {FVariant::integer(1), FVariant::string("1 2"), FVariant::object(node.get())}) {
+    const standin::tests::TestHost::Node other = host.addTrack(TypeWord::Audio, u"FX");
+    for (const FVariant& value : {FVariant::integer(1), FVariant::string("1 2"), FVariant::object(other.get())}) {
         node->setAttribute(Key, value, false);
         EXPECT_FALSE(readNumbers(*node, Key));
     }
