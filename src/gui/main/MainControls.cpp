@@ -146,6 +146,7 @@ MainControls::MainControls(FilesDropped filesDropped) : m_filesDropped(std::move
     addInOrder();
     setUpToggles();
     m_timeline.setName("timelineView");
+    m_video.setName("videodisplay");
     setOpaque(true);
 }
 
@@ -179,6 +180,7 @@ void MainControls::addInOrder()
     addAndMakeVisible(m_timeline);
     addButtons(MainButton::Save, MainButton::Save);
     addCounters({ListPanel::Selected});
+    addAndMakeVisible(m_video);
     addButtons(MainButton::Source, MainButton::Preview);
 }
 
@@ -236,6 +238,7 @@ void MainControls::resized()
         for (std::size_t index = 0; index < m_buttons.size(); ++index)
             m_buttons.at(index)->setBounds(toRectangle(places.button(static_cast<MainButton>(index))));
         m_timeline.setBounds(toRectangle(places.timeline()));
+        m_video.setBounds(toRectangle(places.video()));
     });
 }
 

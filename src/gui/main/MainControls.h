@@ -5,6 +5,7 @@
 #include "gui/main/ListPanel.h"
 #include "gui/main/MainButton.h"
 #include "gui/timeline/EventTimeLineView.h"
+#include "gui/video/VideoDisplay.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
@@ -46,6 +47,7 @@ public:
     /// Nobody hears of it.
     void setOn(MainButton which, bool isOn) { button(which).setToggleState(isOn, juce::dontSendNotification); }
     EventTimeLineView& timeline() { return m_timeline; }
+    VideoDisplay& video() { return m_video; }
 
     /// What stands in the empty table of a list, in the user's language; empty for nothing.
     void setHint(std::int32_t listKind, const std::wstring& hint);
@@ -76,6 +78,7 @@ private:
     std::array<std::unique_ptr<ListPanel>, ListCount> m_panels;
     std::array<std::unique_ptr<juce::Button>, MainButtonCount> m_buttons;
     EventTimeLineView m_timeline;
+    VideoDisplay m_video;
     std::array<juce::String, ListCount> m_hints;
     std::optional<std::int32_t> m_dropTarget; ///< the list over which files are
 };

@@ -11,6 +11,7 @@
 #include "core/notify/ChangeContextNotificationBase.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ShownText.h"
+#include "gui/picture/VideoProviderBase.h"
 #include "util/Result.h"
 
 namespace cadrel::gui {
@@ -34,7 +35,7 @@ MainGui::MainGui()
     setOpaque(true);
     setWantsKeyboardFocus(true);
     addAndMakeVisible(m_controls);
-    for (Sheet* const sheet : std::initializer_list<Sheet*>{&m_fileDialog, &m_editDialog}) {
+    for (Sheet* const sheet : std::initializer_list<Sheet*>{&m_videosDialog, &m_fileDialog, &m_editDialog}) {
         sheet->setBeneath(&m_controls);
         addChildComponent(sheet);
     }
@@ -65,6 +66,12 @@ void MainGui::setNotifier(core::ChangeContextNotificationBase* notifier)
         onChange(core::DataModelChangeContext(nullptr));
 }
 
+void MainGui::setVideoSource(const std::shared_ptr<VideoProviderBase>& provider)
+{
+    guardSystem([&] { m_controls.video().setProvider(provider); });
+    m_videosDialog.setTrackHandler(provider ? &provider->getTrackHandler() : nullptr);
+}
+
 void MainGui::onChange(const core::ChangeContext& context)
 {
     // How a run or a preview ends is told to the user, who has asked for it.
@@ -83,6 +90,7 @@ void MainGui::resized()
 {
     guardSystem([this] {
         m_controls.setBounds(getLocalBounds());
+        m_videosDialog.setBounds(getLocalBounds());
         m_fileDialog.setBounds(getLocalBounds());
     });
 }
@@ -145,8 +153,9 @@ void MainGui::carryOut(MainButton button)
     case MainButton::In:
     case MainButton::Out:
         return m_controls.isOn(button) ? showVideo() : void();
-    case MainButton::Settings:
     case MainButton::Videos:
+        return m_videosDialog.setVisible(true);
+    case MainButton::Settings:
         break;
     }
 }

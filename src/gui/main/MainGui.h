@@ -8,6 +8,7 @@
 #include "gui/look/LookAndFeel.h"
 #include "gui/main/MainControls.h"
 #include "gui/table/EventTableModel.h"
+#include "gui/video/NewVideosDialog.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
@@ -47,11 +48,12 @@ public:
     /// Ends a preview that is on.
     ~MainGui() override;
 
-    /// None of these is owned; each outlives the window or is taken away with null.
+    /// Engine and notifier aren't owned; each outlives the window or is taken away with null.
     void setEngine(core::CadrelerBase* engine) { m_engine = engine; }
     /// Without a notifier there is no model either.
     void setNotifier(core::ChangeContextNotificationBase* notifier);
-    void setVideoSource(VideoProviderBase* provider) { m_video = provider; }
+    /// Where the pictures of the video preview come from; null for nowhere.
+    void setVideoSource(const std::shared_ptr<VideoProviderBase>& provider);
 
     /// Null when no project is active.
     core::DataModel* model() const { return m_model; }
@@ -84,6 +86,8 @@ private:
     /// Which events of the cuts the selected ones come from, in the tables, on the timeline and in the pictures.
     void showSelection();
     void showVideo();
+    /// What the dialog of the videos works on.
+    void showVideoList();
     /// Puts the preview button and those beside it into the state of the model.
     void showPreviewState();
     /// Which buttons can be used, and what to do first.
@@ -115,7 +119,6 @@ private:
     juce::SharedResourcePointer<LookAndFeel> m_look; ///< all windows share it
     core::CadrelerBase* m_engine = nullptr;
     core::ChangeContextNotificationBase* m_notifier = nullptr;
-    VideoProviderBase* m_video = nullptr;
     core::DataModel* m_model = nullptr;
     bool m_isRunRequested = false; ///< until it has ended or was dropped
     bool m_hadFocus = false;       ///< when the run was requested
@@ -123,6 +126,7 @@ private:
     bool m_isModelChanging = false;
     std::wstring m_saveFolder;
     MainControls m_controls;
+    NewVideosDialog m_videosDialog;
     FileDialog m_fileDialog;
     TcEditDialog m_editDialog;
     juce::TooltipWindow m_tooltips;

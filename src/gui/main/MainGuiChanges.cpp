@@ -32,6 +32,8 @@ void MainGui::handle(const ChangeContext& context)
         return setModel(static_cast<const core::DataModelChangeContext&>(context).dataModel);
     case ChangeContext::EventListChanged:
         return listReplaced(static_cast<const core::EventListChangeContext&>(context).listKind);
+    case ChangeContext::VideoListChanged:
+        return m_videosDialog.refresh(m_engine ? m_engine->getMediaPool() : nullptr);
     case ChangeContext::PreviewStateChanged:
         return showPreviewState();
     case ChangeContext::ActionFinished:
@@ -49,10 +51,13 @@ void MainGui::setModel(core::DataModel* model)
     m_isRunRequested = false;
     m_isPreviewTold = false;
     m_editDialog.modelChanged();
-    if (model != m_model || !model)
+    if (model != m_model || !model) {
+        m_videosDialog.setVisible(false);
         letGoOfModel();
+    }
     m_model = model;
     m_fileDialog.setModel(m_model, m_model && m_engine ? m_engine->getProjectName() : std::wstring());
+    guardSystem([this] { showVideoList(); });
     if (m_model)
         showModel();
     showPreviewState();
@@ -63,6 +68,7 @@ void MainGui::letGoOfModel()
 {
     m_controls.forEachPanel([this](ListPanel& panel) { panel.forget(this); });
     m_controls.timeline().setEvents(core::EventList());
+    m_controls.video().setActive(false);
     m_controls.setOn(MainButton::Source, true);
     m_model = nullptr;
 }
