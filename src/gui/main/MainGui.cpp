@@ -183,7 +183,7 @@ void MainGui::selectionChanged(EventTableModel& model)
     ListPanel* const panel = m_controls.panelOf(model);
     if (!panel || !m_model)
         return;
-    m_controls.forEachPanel([](ListPanel& each) { each.updateCounters(); });
+    m_controls.forEachPanel([](ListPanel& each) { each.updateSelected(); });
     panel->storeSelection();
     if (panel->listKind() != ListKind::Change)
         return;

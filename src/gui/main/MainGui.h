@@ -23,6 +23,7 @@ class ActionChangeContext;
 class CadrelerBase;
 class ChangeContextNotificationBase;
 class DataModel;
+class ProtectedRun;
 } // namespace cadrel::core
 
 namespace cadrel::gui {
@@ -103,6 +104,16 @@ private:
     void clear(std::int32_t listKind);
     void save();
     void start();
+    /// How a run is to treat what the change list doesn't carry.
+    enum class Protection {
+        Plain, ///< as the list says
+        Kept,
+        None, ///< there is no run
+    };
+    /// Asks the user where there is something to ask. None also when everything has changed meanwhile.
+    Protection askForProtection();
+    core::ProtectedRun plannedRun() const;
+    void requestRun(Protection protection);
     void switchPreview(bool isOn);
     /// False when the model is another one now.
     bool stopPreview();

@@ -50,27 +50,29 @@ void MainGui::setModel(core::DataModel* model)
     const juce::ScopedValueSetter<bool> changing(m_isModelChanging, true);
     m_isRunRequested = false;
     m_isPreviewTold = false;
-    m_editDialog.modelChanged();
+    guardSystem([this] { m_editDialog.modelChanged(); });
     if (model != m_model || !model) {
-        m_videosDialog.setVisible(false);
+        guardSystem([this] { m_videosDialog.setVisible(false); });
         letGoOfModel();
     }
     m_model = model;
-    m_fileDialog.setModel(m_model, m_model && m_engine ? m_engine->getProjectName() : std::wstring());
+    guardSystem(
+        [this] { m_fileDialog.setModel(m_model, m_model && m_engine ? m_engine->getProjectName() : std::wstring()); });
     guardSystem([this] { showVideoList(); });
     if (m_model)
-        showModel();
-    showPreviewState();
+        guardSystem([this] { showModel(); });
+    guardSystem([this] { showPreviewState(); });
     updateEnablement();
 }
 
+/// Without a project there is no frame rate either.
 void MainGui::letGoOfModel()
 {
-    m_controls.forEachPanel([this](ListPanel& panel) { panel.forget(this); });
-    m_controls.timeline().setEvents(core::EventList());
-    m_controls.video().setActive(false);
-    m_controls.setOn(MainButton::Source, true);
     m_model = nullptr;
+    m_controls.forEachPanel([this](ListPanel& panel) { guardSystem([&] { panel.forget(this); }); });
+    guardSystem([this] { m_controls.timeline().setEvents(core::EventList()); });
+    guardSystem([this] { m_controls.video().setActive(false); });
+    m_controls.setOn(MainButton::Source, true);
 }
 
 void MainGui::showModel()
@@ -93,7 +95,11 @@ void MainGui::showModel()
 
 void MainGui::updateEnablement()
 {
+    const bool wasEnabled = isEnabled();
     setEnabled(m_model && !m_isRunRequested);
+    // A window that is disabled has no keyboard focus.
+    if (!wasEnabled && isEnabled() && !getCurrentlyFocusedComponent() && getPeer() && getPeer()->isFocused())
+        focusChangeTable();
 }
 
 // ---- Lists ---------------------------------------------------------------------------------------------------------
@@ -150,7 +156,24 @@ void MainGui::showSelection()
     showVideo();
 }
 
-void MainGui::showVideo() {}
+void MainGui::showVideo()
+{
+    VideoDisplay& display = m_controls.video();
+    const auto frames = ShownFrames::of(selectedChanges(), m_controls.isOn(MainButton::Out));
+    guardSystem([&] {
+        display.setActive(frames.has_value());
+        if (frames)
+            display.setFrames(frames->oldTime, frames->newTime, frames->isLast);
+    });
+}
+
+void MainGui::showVideoList()
+{
+    core::MediaPoolInterface* const pool = m_model && m_engine ? m_engine->getMediaPool() : nullptr;
+    m_videosDialog.setVideoList(m_model ? &m_model->videoList() : nullptr, pool);
+    if (m_model && m_engine)
+        m_videosDialog.setTimeOrigin(m_engine->getTimeOrigin());
+}
 
 // ---- The preview, and runs -----------------------------------------------------------------------------------------
 

@@ -138,6 +138,38 @@ std::wstring destinationName(const core::EventBase& event, const core::Settings&
 
 } // namespace
 
+std::vector<Track> Project::carriedTracks()
+{
+    findMarkerTracks();
+    std::vector<Track> tracks = cadrelTracks();
+    // The markers of an earlier run aren't carried over: this run writes them anew. completeApply empties the memos' track,
+    // whatever is selected.
+    std::erase_if(tracks, [this](const Track& track) {
+        return track.hostLocked() || isMarkerTrackOfRuns(track) ||
+               !(isWanted(track) || track == markerTrack(TrackRole::Memos));
+    });
+    return tracks;
+}
+
+std::vector<SecondsRange> Project::material()
+{
+    const double origin = timeOrigin();
+    std::vector<SecondsRange> stretches;
+    for (const Track& track : carriedTracks()) {
+        for (const HostEvent& event : track.clipEvents()) {
+            const SecondsRange span = track.eventSpan(event);
+            stretches.push_back({origin + span.start, origin + span.end});
+        }
+        for (const auto& curve : curvesOf(*track.node())) {
+            for (const auto& point : childrenOf(*curve)) {
+                const double start = origin + point->getStart(nullptr);
+                stretches.push_back({start, start});
+            }
+        }
+    }
+    return stretches;
+}
+
 std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBase>& changeEvent)
 {
     const core::Framerate framerate = getFramerate();
@@ -146,14 +178,8 @@ std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBas
     const double dstIn = changeEvent->dstIn().toSeconds(framerate);
     const double dstOut = changeEvent->dstOut().toSeconds(framerate);
 
-    findMarkerTracks();
     core::Cut::CutEvents cutEvents;
-    for (const Track& track : cadrelTracks()) {
-        // The markers of an earlier run aren't carried over: this run writes them anew. completeApply empties the memos'
-        // track, whatever is selected.
-        if (track.hostLocked() || isMarkerTrackOfRuns(track) ||
-            !(isWanted(track) || track == markerTrack(TrackRole::Memos)))
-            continue;
+    for (const Track& track : carriedTracks()) {
         auto cutEvent = std::make_shared<CutEvent>(track, m_indexes);
         cutEvent->setSrcIn(srcIn);
         cutEvent->setSrcOut(srcOut);
