@@ -191,10 +191,26 @@ private:
              ", \"new\": " + textOf(reelJson(m_document.notes.newCut(), reel.pair.newReel)) + ", \"rows\": [");
         const char* separator = "\n";
         for (const NoteEntry& entry : reel.entries) {
-            sink(separator + textOf(entry.step() == nullptr ? keptJson(entry) : stepJson(entry)));
+            sink(separator + textOf(rowJson(entry)));
             separator = ",\n";
         }
         sink("\n]}");
+    }
+
+    ordered_json rowJson(const NoteEntry& entry) const
+    {
+        return entry.step() != nullptr ? stepJson(entry) : entry.kept() != nullptr ? keptJson(entry) : movedJson(entry);
+    }
+
+    ordered_json movedJson(const NoteEntry& entry) const
+    {
+        const core::MoveEnd& end = *entry.moveEnd();
+        return {{"row", "moved"},
+                {"step", end.step},
+                {"at", placeJson(end.place)},
+                {end.isTarget ? "fromReel" : "toReel", end.otherReel + 1},
+                {"frames", end.move.frames},
+                {"offsetFrames", entry.runningOffset}};
     }
 
     ordered_json keptJson(const NoteEntry& entry) const
