@@ -222,13 +222,28 @@ private:
         const char* separator = "\n";
         for (const NoteEntry& entry : reel.entries) {
             const core::StepSound* const sound = m_words.soundOf(entry);
-            const ordered_json row = entry.step() == nullptr ? keptJson(entry) : stepJson(entry);
             sink(separator);
-            sink(sound == nullptr ? textOf(row)
-                                  : withMember(row, "sound", SoundJson(*m_document.sound).ofStep(*sound)));
+            sink(sound == nullptr ? textOf(rowJson(entry))
+                                  : withMember(rowJson(entry), "sound", SoundJson(*m_document.sound).ofStep(*sound)));
             separator = ",\n";
         }
         sink("\n]}");
+    }
+
+    ordered_json rowJson(const NoteEntry& entry) const
+    {
+        return entry.step() != nullptr ? stepJson(entry) : entry.kept() != nullptr ? keptJson(entry) : movedJson(entry);
+    }
+
+    ordered_json movedJson(const NoteEntry& entry) const
+    {
+        const core::MoveEnd& end = *entry.moveEnd();
+        return {{"row", "moved"},
+                {"step", end.step},
+                {"at", placeJson(end.place)},
+                {end.isTarget ? "fromReel" : "toReel", end.otherReel + 1},
+                {"frames", end.move.frames},
+                {"offsetFrames", entry.runningOffset}};
     }
 
     ordered_json keptJson(const NoteEntry& entry) const

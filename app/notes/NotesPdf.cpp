@@ -242,6 +242,8 @@ private:
                          isMoved ? Moved : Band);
             return;
         }
+        if (entry.step() == nullptr)
+            return;
         const core::NoteStep& step = *entry.step();
         if (!drawsMoves || step.action == core::StepAction::Move)
             return;
@@ -334,7 +336,7 @@ private:
 
     void addRow(const NoteEntry& entry, std::size_t reel)
     {
-        if (entry.kept() != nullptr) {
+        if (entry.step() == nullptr) {
             add(10.5,
                 [this, &entry, reel](PdfPages&, double top) { drawTimes(entry, reel, top + 8, SmallTimeFont, Dim); });
             return;

@@ -256,7 +256,7 @@ TEST(Notes, TheFiguresOfTheExampleAreThoseOfItsListOfChanges)
     std::vector<std::string> versions;
     int change = 0;
     for (const json& row : notes.at("reels")[0].at("rows")) {
-        if (row.at("row") == "kept")
+        if (row.at("row") != "step")
             continue;
         change += row.at("lengthChangeFrames").get<int>();
         moves += row.at("action") == "move" ? 1 : 0;
@@ -373,7 +373,7 @@ TEST(Notes, APartOfAShotTellsTheSourceOfThePart)
     EXPECT_EQ(text.find("source 00:00:41:16"), std::string::npos) << text;
     std::vector<std::string> sources;
     for (const json& row : notes.at("reels")[0].at("rows")) {
-        if (row.at("row") == "kept")
+        if (row.at("row") != "step")
             continue;
         for (const json& change : row.at("changes")) {
             if (change.contains("sourceIn"))
@@ -519,9 +519,27 @@ TEST(Notes, PictureThatGoesToALaterReelIsToldWhereItGoes)
 
     const Outcome outcome = film.notes();
 
-    EXPECT_NE(outcome.out.find("   1  01:00:20:00  move 00:00:10:00 to 02:00:00:00     -00:00:10:00 -00:00:10:00\n"),
+    EXPECT_NE(outcome.out.find("   1  01:00:20:00  move 00:00:10:00 to 02:00:00:00     -00:00:10:00 -00:00:10:00\n"
+                               "      moved 00:00:10:00                  A002\n"
+                               "        in the old cut at 01:00:20:00\n"),
               std::string::npos)
         << outcome.out;
+    // The later reel tells of it without a number.
+    EXPECT_NE(outcome.out.find("      02:00:00:00  moved 00:00:10:00 from reel 1, step 1            +00:00:10:00\n"
+                               "      A002\n"
+                               "      02:00:00:00  kept 00:00:10:00, was 01:00:20:00                +00:00:10:00\n"),
+              std::string::npos)
+        << outcome.out;
+    film.file(".pdf");
+    EXPECT_NE(unbroken(textOfPdf(film.folder / "notes.pdf"))
+                  .find("02:00:00:00 moved 00:00:10:00 from reel 1, step 1 +00:00:10:00"),
+              std::string::npos);
+    const json told = json::parse(film.file(".json")).at("reels")[1].at("rows")[0];
+    EXPECT_EQ(told, json::parse(R"({"row": "moved", "step": 1, "fromReel": 1, "frames": 240, "offsetFrames": 240,
+                                    "at": {"reel": 2, "timecode": "02:00:00:00", "frame": 0}})"));
+    // The CSV has a row a step.
+    const std::string csv = film.file(".csv");
+    EXPECT_EQ(std::count(csv.begin(), csv.end(), '\n'), 2);
 }
 
 TEST(Notes, ACutHasNothingToTellOfItself)
