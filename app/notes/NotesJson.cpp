@@ -62,7 +62,7 @@ public:
         ordered_json jumps = ordered_json::array();
         for (const core::AutomationJump& jump : sound.jumps) {
             ordered_json json{{"in", timeJson(jump.place.start)}, {"out", timeJson(jump.place.end)}};
-            json["tracks"] = jump.where;
+            json["tracks"] = jump.tracks;
             jumps.push_back(std::move(json));
         }
         ordered_json tracks = ordered_json::array();
