@@ -25,6 +25,9 @@ namespace cadrel::host {
 
 namespace {
 
+/// No offset of a project is further away, in seconds: over 15 years.
+constexpr double FurthestOffset = 5e8;
+
 void gatherTracks(IProjectNode& parent, std::vector<Counted<ITrackNode>>& tracks)
 {
     for (const Counted<IProjectNode>& child : childrenOf(parent)) {
@@ -172,7 +175,8 @@ void Project::computePreviewOffset()
 
 void Project::ensurePreviewOffset()
 {
-    if (!hasPreviewOffset() || (!hasWritten() && previewOffset() < dayPastMaterial()))
+    if (!hasPreviewOffset() || previewOffset() > FurthestOffset ||
+        (!hasWritten() && previewOffset() < dayPastMaterial()))
         computePreviewOffset();
 }
 

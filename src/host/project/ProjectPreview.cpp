@@ -100,6 +100,7 @@ void Project::startWriting()
 {
     ensurePreviewOffset();
     m_writingFrom = requiredOffset() - timeOrigin();
+    m_leftOutEvents.clear();
 }
 
 void Project::rememberWritten()
