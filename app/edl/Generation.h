@@ -32,6 +32,8 @@ struct Cuts {
     std::vector<std::string> newNames;
     std::vector<UnreadOfFile> oldUnread;
     std::vector<UnreadOfFile> newUnread;
+    std::vector<std::string> oldOverlapping; ///< files with picture on the timecode of another file of their cut
+    std::vector<std::string> newOverlapping;
     std::vector<std::string> unmatched; ///< the events that the change EDL was made without, and why; the first of many
 };
 
@@ -39,6 +41,7 @@ struct Cuts {
 struct ReadFiles {
     std::vector<std::string> names;
     std::vector<UnreadOfFile> unread;
+    std::vector<std::string> overlapping;
 };
 
 /// The files of both cuts.
