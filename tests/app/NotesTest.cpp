@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/Film.h"
+#include "tests/app/NotesOfCuts.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/support/TreePaths.h"
 
@@ -33,39 +34,6 @@ std::ptrdiff_t columnsOf(const std::string& text)
                          [](char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U; });
 }
 
-/// An old and a new cut in a folder of their own.
-class Cuts {
-public:
-    Cuts(const std::string& oldText, const std::string& newText)
-        : m_old(folder.write("old.edl", oldText)), m_new(folder.write("new.edl", newText))
-    {
-    }
-
-    Outcome notes(const std::vector<std::string>& more = {}) const
-    {
-        std::vector<std::string> arguments{"notes", "--old", m_old, "--new", m_new};
-        arguments.insert(arguments.end(), more.begin(), more.end());
-        return runCadrel(arguments);
-    }
-
-    /// The notes in the form of that extension.
-    std::string file(const std::string& extension, std::vector<std::string> more = {}) const
-    {
-        const std::string path = folder / ("notes" + extension);
-        more.insert(more.end(), {"-o", path});
-        const Outcome outcome = notes(more);
-        EXPECT_EQ(outcome.status, 0) << outcome.err;
-        EXPECT_EQ(outcome.out, "");
-        return contentOf(path);
-    }
-
-    const TempFolder folder;
-
-private:
-    const std::string m_old;
-    const std::string m_new;
-};
-
 std::vector<std::string> reel3(std::vector<std::string> more)
 {
     std::vector<std::string> arguments{"notes",
@@ -86,23 +54,6 @@ json reel3Json()
     const Outcome outcome = runCadrel(reel3({"-o", path}));
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     return json::parse(contentOf(path));
-}
-
-/// A text with a single blank wherever there are blanks or line ends.
-std::string unbroken(const std::string& text)
-{
-    std::istringstream stream(text);
-    std::string all;
-    for (std::string word; stream >> word;)
-        all.append(all.empty() ? "" : " ").append(word);
-    return all;
-}
-
-std::string textOfPdf(const std::string& file)
-{
-    const Outcome outcome = runProgram("pdftotext", {"-layout", file, "-"});
-    EXPECT_EQ(outcome.status, 0) << outcome.err;
-    return outcome.out;
 }
 
 TEST(Notes, ShowsTheStepsAsText)
