@@ -9,7 +9,6 @@
 #include "app/console/Wording.h"
 #include "app/edl/ProjectFramerate.h"
 #include "app/settings/SettingsTable.h"
-#include "core/settings/FrameBounds.h"
 #include "core/settings/Settings.h"
 
 #include <CLI/CLI.hpp>
@@ -246,7 +245,7 @@ public:
                     add([kind, frames](Settings& settings) { settings.set(kind.option, frames); });
                 },
                 m_entry.help)
-            ->check(CLI::Range(core::FrameBounds::Fewest, core::FrameBounds::Most))
+            ->check(CLI::Range(0, MostFrames))
             ->type_name("FRAMES");
     }
 
@@ -263,7 +262,7 @@ public:
                                                });
                                            },
                                            m_entry.help)
-                                       ->check(CLI::Range(kind.least, kind.greatest))
+                                       ->check(CLI::Range(Number(0), kind.greatest))
                                        ->type_name(kind.numberName);
         addOff(kind.isOn, kind.offHelp)->excludes(bound);
         return bound;

@@ -76,12 +76,11 @@ public:
     }
     void focusOfChildComponentChanged(FocusChangeType cause) override
     {
-        // A listener may delete the input.
-        const SafePointer<StartInput> self(this);
-        TcInput::focusOfChildComponentChanged(cause);
         guardSystem([&] {
-            if (self && self->hasKeyboardFocus(true))
-                bringIntoView(*self);
+            const SafePointer<StartInput> self(this);
+            TcInput::focusOfChildComponentChanged(cause);
+            if (self && hasKeyboardFocus(true))
+                bringIntoView(*this);
         });
     }
 
@@ -226,27 +225,25 @@ void VideoListTableModel::toggleSelected()
 template <class Edit>
 void VideoListTableModel::edit(const Edit& change)
 {
-    // Whoever is told of the change may end the model.
-    const std::weak_ptr<const char> life = m_life;
-    guardUser(change);
-    if (!life.expired())
-        reload();
+    guardUser([&] {
+        // Whoever is told of the change may end the model.
+        const std::weak_ptr<const char> life = m_life;
+        guardUser(change);
+        if (!life.expired())
+            reload();
+    });
 }
 
 void VideoListTableModel::timecodeChanged(TcInput& input)
 {
-    guardUser([&] {
-        const auto& start = dynamic_cast<const StartInput&>(input);
-        edit([this, path = start.path, value = start.getValue()] { m_rows.setStart(path, value); });
-    });
+    if (const auto* const start = dynamic_cast<const StartInput*>(&input))
+        edit([this, path = start->path, value = start->getValue()] { m_rows.setStart(path, value); });
 }
 
 void VideoListTableModel::buttonClicked(juce::Button* button)
 {
-    guardUser([&] {
-        const auto& box = dynamic_cast<const UseBox&>(*button);
-        edit([this, path = box.path, isUsed = box.getToggleState()] { m_rows.setUsed(path, isUsed); });
-    });
+    if (const auto* const box = dynamic_cast<const UseBox*>(button))
+        edit([this, path = box->path, isUsed = box->getToggleState()] { m_rows.setUsed(path, isUsed); });
 }
 
 // ---- Cells ---------------------------------------------------------------------------------------------------------

@@ -32,8 +32,8 @@ public:
     VideoSourceBase& operator=(const VideoSourceBase&) = delete;
     virtual ~VideoSourceBase() = default;
 
-    /// The frame that begins at `time`, in seconds of the project's clock. `lastFrame` tells that it is the last one before an
-    /// OUT point.
+    /// `time` in seconds of the project's clock. `lastFrame` asks for the picture before an OUT point, which decides for
+    /// one of two clips that meet there.
     virtual VideoFrame getFrame(bool lastFrame, double time) = 0;
 
     /// Listeners are not owned.
