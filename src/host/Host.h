@@ -33,6 +33,7 @@ namespace cadrel::host {
 
 class Project;
 class ProjectVideo;
+enum class VideoWriting;
 
 /// The one object through which the engine and the window reach the host. It keeps a Project for each project that is open
 /// there, follows which one is active, and carries out what the engine asks for on that one.
@@ -186,8 +187,9 @@ private:
                                   std::uint32_t options);
     /// With `leaving` the preview is switched off afterwards, also when it fails.
     util::Result::Type finishPreview(bool leaving);
-    /// Tells the user when his lock has kept the new video from its track.
-    static void tellOfVideo(bool isWritten);
+    /// Tell the user of what is left out: of the new video, and of what the change list carries over.
+    static void tellOfVideo(VideoWriting writing);
+    static void tellOfLeftOut(const Project& project);
 
     // The user may close or leave the project while the progress window lets events through. So the project is held, and
     // the edit ends as soon as it isn't the active one any more.

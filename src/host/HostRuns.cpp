@@ -14,6 +14,7 @@
 #include "host/undo/DataModelEditStep.h"
 #include "host/undo/PreviewEventsStep.h"
 #include "host/video/ProjectVideo.h"
+#include "host/video/VideoWriting.h"
 #include "util/StringUtil.h"
 #include "velmark/UserInterface.h"
 
@@ -167,7 +168,7 @@ Result::Type Host::runCadrel()
     const core::EventList& changeList = project.model().changeEdl();
     return withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
         Counted<IActionManager> actions; // once the user has cancelled
-        bool isVideoWritten = true;
+        VideoWriting video = VideoWriting::Done;
         const Result::Type result = edit(project, Apply, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle);
@@ -182,7 +183,7 @@ Result::Type Host::runCadrel()
             requireSuccess(ran);
             requireActive(project);
             project.createVideoTracks(transaction);
-            isVideoWritten = m_videoProvider->apply(true, transaction, 0.0);
+            video = m_videoProvider->apply(true, transaction, 0.0);
             double start = 0.0;
             double end = 0.0;
             project.getApplyRange(start, end);
@@ -193,7 +194,8 @@ Result::Type Host::runCadrel()
             takeBack(project, *actions);
             throw Result::Cancelled;
         }
-        tellOfVideo(isVideoWritten);
+        tellOfVideo(video);
+        tellOfLeftOut(project);
     });
 }
 
@@ -205,7 +207,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
         return Result::NoProject;
     Project& project = *held;
     return withProgress(project, {L"Project Preview", false}, events.size(), [&] {
-        bool isVideoWritten = true;
+        VideoWriting video = VideoWriting::Done;
         requireSuccess(edit(project, Preview, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle, m_modelSnapshot);
@@ -215,7 +217,7 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
             requireSuccess(CadrelerBase::startPreview(events, first, last, options));
             requireActive(project);
             const double offset = project.previewOffset();
-            isVideoWritten = m_videoProvider->apply(true, transaction, offset);
+            video = m_videoProvider->apply(true, transaction, offset);
             // Without material in the preview the project ends before it.
             project.closeRange(isOnlySelected(project.model().settings()), offset,
                                std::max(offset, project.projectEnd()));
@@ -226,7 +228,8 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
         }));
         requireActive(project);
         requireSuccess(cycleToEvents(events, first, last, options));
-        tellOfVideo(isVideoWritten);
+        tellOfVideo(video);
+        tellOfLeftOut(project);
     });
 }
 
@@ -257,10 +260,36 @@ Result::Type Host::finishPreview(bool leaving)
     });
 }
 
-void Host::tellOfVideo(bool isWritten)
+void Host::tellOfVideo(VideoWriting writing)
 {
-    if (!isWritten)
+    switch (writing) {
+    case VideoWriting::Done:
+        break;
+    case VideoWriting::WithoutBeginning:
+        showAlert(L"The new video begins before the project does. What would stand there hasn't been written.");
+        break;
+    case VideoWriting::TrackLocked:
         showAlert(L"The track of the new video is locked. The new video hasn't been written.");
+        break;
+    case VideoWriting::BeforeProject:
+        showAlert(L"The new video ends before the project begins. The new video hasn't been written.");
+        break;
+    case VideoWriting::NoMediaPool:
+        showAlert(L"The project has no media pool. The new video hasn't been written.");
+        break;
+    }
+}
+
+void Host::tellOfLeftOut(const Project& project)
+{
+    const std::vector<std::uint32_t>& events = project.leftOutEvents();
+    if (events.empty())
+        return;
+    const std::wstring first = std::to_wstring(events.front());
+    const std::wstring whose =
+        events.size() == 1 ? L"event " + first
+                           : std::to_wstring(events.size()) + L" events, the first of them event " + first + L",";
+    showAlert(L"Material of " + whose + L" would stand before the project begins. It has been left out.");
 }
 
 Result::Type Host::withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,
@@ -412,7 +441,6 @@ void Host::setPreviewActive(bool active)
         model.notifyPreviewState();
     });
     if (!active) {
-        project.previewEvents().clear();
         failure.ofStep([&] { project.findLockedTracks(); });
         failure.ofStep([&] { project.setTracksLocked(false); });
         project.releaseLockTracks();

@@ -319,44 +319,34 @@ private:
     /// The user's tracks as they are stored, without what says who holds them and what a memo is known by.
     json tracks()
     {
-        const json all = json::parse(run.bytes());
+        std::vector<json> stored;
+        flatten(json::parse(run.bytes())["tracks"], stored);
+        const Tracks live = run.project.allTracks();
+        RC_ASSERT(stored.size() == live.size());
         json found = json::array();
-        collect(all["tracks"], found);
-        return found;
-    }
-    static void collect(const json& stored, json& found)
-    {
-        for (json track : stored) {
-            const std::string kind = track["kind"];
-            if (kind == "folder") {
-                collect(track["tracks"], found);
+        for (std::size_t index = 0; index < live.size(); ++index) {
+            if (!RandomRun::isUsers(*live[index]))
                 continue;
-            }
-            json& attributes = track["attributes"];
+            json& attributes = stored[index]["attributes"];
             if (attributes.is_null())
                 attributes = json::object();
-            if (kind == "ruler" || isOfSystem(kind, attributes))
-                continue;
             attributes.erase(AttributeKey::LockState);
+            found.push_back(stored[index]);
+        }
+        return found;
+    }
+    /// In the order of the live ones, which have a role also where it isn't one that the project stores.
+    static void flatten(const json& stored, std::vector<json>& found)
+    {
+        for (const json& track : stored) {
             found.push_back(track);
+            if (track["kind"] == "folder")
+                flatten(track["tracks"], found);
         }
     }
     static bool isOfMemos(standin::Track& track)
     {
-        FVariant role;
-        return track.kind() == standin::Track::Kind::Marker &&
-               track.getAttribute(AttributeKey::MarkerType, role) == ResultOk && role.isInteger() &&
-               (role.asInteger() & 0xff) == TrackRole::Memos;
-    }
-    static bool isOfSystem(const std::string& kind, const json& attributes)
-    {
-        const bool isVideo = kind == "video";
-        const auto role = attributes.find(isVideo ? AttributeKey::VideoType : AttributeKey::MarkerType);
-        if ((!isVideo && kind != "marker") || role == attributes.end() || !role->is_number_integer())
-            return false;
-        const std::int64_t number = role->get<std::int64_t>() & 0xff;
-        return isVideo ? number == TrackRole::NewVideo
-                       : number >= TrackRole::Destination && number <= TrackRole::LastMarker;
+        return track.kind() == standin::Track::Kind::Marker && RandomRun::roleOf(track) == TrackRole::Memos;
     }
     static json filmOf(json tracks)
     {

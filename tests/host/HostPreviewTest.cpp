@@ -25,6 +25,7 @@
 #include <cstdint>
 #include <functional>
 #include <initializer_list>
+#include <limits>
 #include <memory>
 #include <string>
 #include <utility>
@@ -1008,6 +1009,40 @@ TEST_P(HostPreviewTest, MovesFurtherAwayWhereMaterialHasComeToReachItsPlace)
     }
 }
 
+TEST_P(HostPreviewTest, ComesBackFromAPlaceThatIsNoTimeOfAProject)
+{
+    constexpr double Furthest = 5e8;
+    constexpr double Infinity = std::numeric_limits<double>::infinity();
+    constexpr double NoNumber = std::numeric_limits<double>::quiet_NaN();
+    for (const auto& [stored, place] :
+         {Span(Furthest, Furthest), Span(Furthest + 1.0, Day), Span(1e300, Day), Span(Infinity, Day),
+          Span(-Infinity, Day), Span(-1e300, Day), Span(NoNumber, Day)}) {
+        SCOPED_TRACE(stored);
+        host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(stored));
+
+        adapter().setPreviewActive(true);
+        EXPECT_EQ(adapter().getRunState().previewOffset, place);
+        adapter().setPreviewActive(false);
+    }
+}
+
+TEST_P(HostPreviewTest, EndsAlsoWhereItsStoredPlaceIsNoTimeOfAProject)
+{
+    const Texts film = host.contentOf(track);
+    previewAll();
+    host.model().setProperty(PropertyKey::PreviewOffset, core::Variant(1e300));
+    host.project.announceStoring();
+    host.disconnect();
+    host.connect();
+
+    previewAll();
+    const Texts preview{"one 0-10", "two 10-20", "two 172800-172810", "one 172810-172820"};
+    EXPECT_EQ(host.contentOf(track), preview) << "Past the one that stood there already.";
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track), film);
+}
+
 TEST_P(HostPreviewTest, LeavesMaterialWholeThatHasComeToReachItsPlace)
 {
     host.conform();
@@ -1032,6 +1067,18 @@ TEST_P(HostPreviewTest, MovesFurtherAwayWhereTheTimeOriginHasMoved)
     adapter().setPreviewActive(false);
 
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostPreviewTest, TellsWhatWouldStandBeforeTheProjectBegins)
+{
+    host.project.setTimeOrigin(3604.0);
+    host.idle();
+    host.addClip(track, u"steps", 7.0, 8.0); // from 01:00:11:00 on, which goes to 01:00:01:00
+
+    previewAll();
+
+    const Entries told{u"Material of event 2 would stand before the project begins. It has been left out."};
+    EXPECT_EQ(host.alerts->messages, told);
 }
 
 // Memos.
@@ -1170,6 +1217,24 @@ TEST_P(HostMemoTest, FollowThePreviewThatWasOnWhenTheProjectWasSaved)
 
     EXPECT_EQ(filmMemos(), (Texts{"hiss 2-4", "click 7-7", "far 30-30"}));
     EXPECT_TRUE(host.alerts->messages.empty());
+}
+
+TEST_P(HostMemoTest, FollowTheirCopiesStillWhereThePreviewCouldNotEnd)
+{
+    adapter().setPreviewActive(true);
+    host.preview(firstChange());
+    host.idle();
+    ASSERT_EQ(host.contentOf(memos).size(), 5U);
+    ASSERT_EQ(host.application.edits().begin(true), ResultOk);
+    EXPECT_EQ(thrownBy([&] { adapter().setPreviewActive(false); }), Result::HostCallFailed);
+    ASSERT_EQ(host.application.edits().commit(&host.project, u"Mix"), ResultOk);
+
+    adapter().setPreviewActive(true);
+    host.idle();
+    edit([&] { copyOf(u"hiss")->setName(nullptr, standin::tests::text(u"hum").get(), 0); });
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"hum 2-4", "click 6-6", "far 30-30"}));
 }
 
 TEST_P(HostMemoTest, FollowTheirCopiesAlsoWhereTheTimeOriginHasMovedMeanwhile)

@@ -5,6 +5,7 @@
 #include "core/cut/Cut.h"
 #include "core/notify/ChangeContext.h"
 #include "host/Host.h"
+#include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
 #include "standin/services/IdleManager.h"
@@ -12,6 +13,7 @@
 #include "tests/support/host/AdaptedHost.h"
 #include "tests/support/host/WatchedProgress.h"
 #include "tests/support/standin/TestHost.h"
+#include "velmark/Attributes.h"
 #include "velmark/Transport.h"
 
 #include <gtest/gtest.h>
@@ -741,6 +743,100 @@ TEST_P(HostRunTest, IsCompleteWhereTheNewVideoBeginsBeforeATimeOriginThatHasMove
     EXPECT_EQ(events[0]->getStart(nullptr), 0.0);
     EXPECT_EQ(events[0]->getEnd(nullptr), 14.0);
     EXPECT_EQ(events[0]->getSourceOffset(nullptr), 6.0);
+    const std::u16string told =
+        u"The new video begins before the project does. What would stand there hasn't been written.";
+    EXPECT_EQ(std::ranges::count(host.alerts->messages, told), 1);
+}
+
+TEST_P(HostRunTest, TellsThatTheNewPictureIsNotWrittenWhereItWouldStandBeforeTheProject)
+{
+    host.project.setTimeOrigin(3600.0);
+    host.idle();
+    core::VideoList& videos = host.model().videoList();
+    const auto setVideo = [&](const char* start) {
+        videos.clear();
+        videos.add(
+            core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode(start), core::Timecode("00:00:20:00")),
+            false);
+    };
+    setVideo("01:00:00:00");
+    host.conform();
+    ASSERT_TRUE(host.alerts->messages.empty());
+    const auto video = host.trackNamed(u"New Video");
+    ASSERT_EQ(standin::tests::childrenOf(*video).size(), 1U);
+    setVideo("00:59:40:00");
+
+    host.conform();
+
+    const std::u16string told = u"The new video ends before the project begins. The new video hasn't been written.";
+    EXPECT_EQ(host.alerts->messages, Entries{told});
+    EXPECT_EQ(standin::tests::childrenOf(*video).size(), 2U) << "Its halves have changed places, as on all tracks.";
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(host.alerts->messages, (Entries{told, told}));
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(standin::tests::childrenOf(*video).size(), 2U);
+}
+
+// The project begins at 01:00:04:00, and an event brings what stands from 6 s to 16 s of the host to 01:00:00:00.
+TEST_P(HostRunTest, TellsWhatWouldStandBeforeTheProjectBegins)
+{
+    query<ITrackNode>(track)->setFlag(TrackFlag::Lock, true);
+    const auto other = host.addTrack(TypeWord::Audio, u"FX");
+    host.project.setTimeOrigin(3604.0);
+    host.idle();
+    constexpr double Frame = 1.0 / 25.0;
+    struct Case {
+        double start;
+        double end;
+        double from; ///< which stretch may change; all where it is empty
+        double to;
+        bool isTold;
+    };
+    for (const Case& at :
+         {Case{5.0, 6.0, 0.0, 0.0, false}, Case{5.0, 6.0 + Frame, 0.0, 0.0, true}, Case{7.0, 8.0, 0.0, 0.0, true},
+          Case{10.0 - Frame, 12.0, 0.0, 0.0, true}, Case{10.0, 12.0, 0.0, 0.0, false}, Case{0.0, 20.0, 0.0, 0.0, true},
+          Case{7.0, 8.0, 3602.0, 3700.0, false}, Case{7.0, 8.0, 3602.0 - Frame, 3700.0, true},
+          Case{7.0, 8.0, 3590.0, 3601.0, false}, Case{7.0, 8.0, 3590.0, 3601.0 + Frame, true},
+          Case{7.0, 8.0, 3604.0, 3700.0, false}}) {
+        SCOPED_TRACE(at.start + at.from);
+        const auto clip = host.addClip(other, u"steps", at.start, at.end);
+        host.settings().setRestrictRange(at.from < at.to);
+        if (at.from < at.to)
+            host.settings().setPreserveMaterial(at.from, at.to);
+        host.alerts->messages.clear();
+
+        host.conform();
+
+        const Entries told{u"Material of event 2 would stand before the project begins. It has been left out."};
+        EXPECT_EQ(host.alerts->messages, at.isTold ? told : Entries());
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+        ASSERT_TRUE(host.undo());
+        host.edit(u"Remove", [&] { host.transaction()->remove(other.get(), clip.get()); });
+    }
+}
+
+TEST_P(HostRunTest, TellsOfHowManyEventsSomethingWouldStandBeforeTheProjectBegins)
+{
+    host.carryOver("01:00:10:00", "01:00:20:00", "00:59:00:00", "00:59:10:00");
+    host.carryOver("01:00:10:00", "01:00:20:00", "02:00:00:00", "02:00:10:00");
+    const auto memos = host.addTrack(TypeWord::Marker, u"Memos");
+    requireOk(memos->setAttribute(AttributeKey::MarkerType, FVariant::integer(TrackRole::Memos), true));
+    host.project.setTimeOrigin(3604.0);
+    host.idle();
+    host.addPointMarker(memos, u"louder", 7.0);
+
+    host.conform();
+    const Entries told{
+        u"Material of 2 events, the first of them event 2, would stand before the project begins. It has "
+        u"been left out."};
+    EXPECT_EQ(host.alerts->messages, told);
+
+    ASSERT_TRUE(host.undo());
+    host.project.setTimeOrigin(0.0);
+    host.idle();
+    host.conform();
+    EXPECT_EQ(host.alerts->messages, told) << "There is room for all of it, and nothing is told again.";
 }
 
 TEST_P(HostRunTest, SeesNoTrackAnyMoreThatItsUndoTakesAway)

@@ -192,10 +192,7 @@ public:
     std::optional<std::vector<Warning>> warnings() const
     {
         for (standin::Track* const track : project.allTracks()) {
-            FVariant role;
-            if (track->kind() != standin::Track::Kind::Marker ||
-                track->getAttribute(AttributeKey::MarkerType, role) != ResultOk || !role.isInteger() ||
-                (role.asInteger() & 0xff) != TrackRole::AutomationWarning)
+            if (track->kind() != standin::Track::Kind::Marker || roleOf(*track) != TrackRole::AutomationWarning)
                 continue;
             if (track->isLocked())
                 return std::nullopt;
@@ -228,10 +225,22 @@ public:
     Tracks usersTracks() const
     {
         Tracks tracks = project.allTracks();
-        std::erase_if(tracks, [](standin::Track* track) {
-            return track->isFolder() || track->kind() == standin::Track::Kind::Ruler || hasRole(*track);
-        });
+        std::erase_if(tracks, [](standin::Track* track) { return !isUsers(*track); });
         return tracks;
+    }
+    static bool isUsers(standin::Track& track)
+    {
+        return !track.isFolder() && track.kind() != standin::Track::Kind::Ruler && !hasRole(track);
+    }
+    /// What the system uses it for, from its attributes, random ones as well; -1 without such an attribute.
+    static std::int64_t roleOf(standin::Track& track)
+    {
+        const bool isVideo = track.kind() == standin::Track::Kind::Video;
+        FVariant role;
+        if (track.getAttribute(isVideo ? AttributeKey::VideoType : AttributeKey::MarkerType, role) != ResultOk ||
+            !role.isInteger())
+            return -1;
+        return role.asInteger() & 0xff;
     }
 
     /// Instants of the project at which nothing begins or ends, before the run or after it.
@@ -341,18 +350,14 @@ private:
         changes.push_back({inHost(source), inHost(destination), inHost(source + length) - inHost(source)});
     }
 
-    /// Whether something in the random attributes makes it one on which the system writes.
+    /// Whether it is one on which the system writes.
     static bool hasRole(standin::Track& track)
     {
         using Kind = standin::Track::Kind;
-        const bool isVideo = track.kind() == Kind::Video;
-        FVariant role;
-        if ((!isVideo && track.kind() != Kind::Marker) ||
-            track.getAttribute(isVideo ? AttributeKey::VideoType : AttributeKey::MarkerType, role) != ResultOk ||
-            !role.isInteger())
-            return false;
-        const std::int64_t kind = role.asInteger() & 0xff;
-        return isVideo ? kind == TrackRole::NewVideo : kind >= TrackRole::Destination && kind <= TrackRole::LastMarker;
+        const std::int64_t role = roleOf(track);
+        if (track.kind() == Kind::Video)
+            return role == TrackRole::NewVideo;
+        return track.kind() == Kind::Marker && role >= TrackRole::Destination && role <= TrackRole::LastMarker;
     }
 
     Chance& m_chance;

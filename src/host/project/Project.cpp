@@ -25,6 +25,9 @@ namespace cadrel::host {
 
 namespace {
 
+/// No offset of a project is further away, in seconds: over 15 years.
+constexpr double FurthestOffset = 5e8;
+
 void gatherTracks(IProjectNode& parent, std::vector<Counted<ITrackNode>>& tracks)
 {
     for (const Counted<IProjectNode>& child : childrenOf(parent)) {
@@ -172,7 +175,8 @@ void Project::computePreviewOffset()
 
 void Project::ensurePreviewOffset()
 {
-    if (!hasPreviewOffset() || (!hasWritten() && previewOffset() < dayPastMaterial()))
+    if (!hasPreviewOffset() || previewOffset() > FurthestOffset ||
+        (!hasWritten() && previewOffset() < dayPastMaterial()))
         computePreviewOffset();
 }
 
@@ -279,8 +283,12 @@ void Project::rememberMemos()
 {
     // What is known of an earlier preview would be taken for edits of this one.
     m_memoSync.forget();
-    const Track& memos = markerTrack(TrackRole::Memos);
-    if (isPreviewing() && memos.isAlive())
+    if (!isPreviewing())
+        return;
+    m_memoSync.forgetCopies(m_previewEvents->events());
+    // An undo may have brought the track back.
+    Track& memos = markerTrack(TrackRole::Memos);
+    if (findTrack(memos, TypeWord::Marker, TrackRole::Memos))
         m_memoSync.remember(memos, previewed());
 }
 

@@ -122,8 +122,9 @@ public:
     void resetPreviewOffset();
     /// Stores the first whole day past every event and every automation point in the project as the offset.
     void computePreviewOffset();
-    /// Does so where there is none, or where the one there has become too small: the time origin has moved, or material
-    /// has come to reach it. What the system has written stands where it was written, and has to be cleared first.
+    /// Does so where there is none or one that is no time of a project, and where the one there has become too small: the time
+    /// origin has moved, or material has come to reach it. What the system has written stands where it was written, and has
+    /// to be cleared before an offset counts as too small.
     void ensurePreviewOffset();
     void getLocators(double& left, double& right) const;
     /// With `adjust` both move down by a tenth of their distance and lose the time origin; without they go to the host as
@@ -151,16 +152,20 @@ public:
 
     // Work for the engine; in ProjectEdits.cpp.
 
-    /// Writes the source of the cut's events to their destination in the preview stretch.
+    /// Writes the source of the cut's events to their destination in the preview stretch. What would stand before the time
+    /// origin is left out.
     void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
+    /// The numbers of the events of which processCut has left out something that is there, since startWriting. What a
+    /// restricted run doesn't replace doesn't count.
+    const std::vector<std::uint32_t>& leftOutEvents() const { return m_leftOutEvents; }
     /// The tracks are those whose material a run carries over, and the memos'.
     std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
     /// Brings the preview stretch back over the real programme, from which the markers of an earlier run go. Those that
     /// reach out of a restricted range are cut at its edge: outside of it the programme is still the one that they describe.
     /// A restricted run clears the preview too, also where its range is empty and nothing is brought back.
     void completeApply(Velmark::IEditTransaction& transaction);
-    /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws Result::InvalidArgument for an entry
-    /// whose kind is none of MarkerKind; earlier ones stay written.
+    /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws
+    /// Result::InvalidArgument for an entry whose kind is none of MarkerKind; earlier ones stay written.
     void generateMarkers(Velmark::IEditTransaction& transaction, const std::vector<core::MarkerEntry>& entries);
     /// Lets each curve keep the value that it has come to where the cuts leave a gap and after the last cut, to the end of
     /// what the run replaces, and have its first one before the first cut. With `isWholeProgramme` it keeps the last one for
@@ -182,8 +187,8 @@ public:
     /// out all, and throws the first failure at the end.
     void rememberWritten();
     /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
-    /// since stays, and so does what he has moved, renamed, slipped or given another length; a copy that he has changed in no
-    /// other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
+    /// since stays, and so does what he has moved, renamed, slipped or given another length, clip or content; a copy that he
+    /// has changed in no other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
     /// written.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
@@ -251,12 +256,11 @@ private:
     /// All that a run may change but these.
     std::vector<Track> tracksOfTheUser();
     /// What of a track's events in a stretch the system hasn't written, in seconds from the time origin.
-    std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
-                                                                     const core::SecondsRange& stretch);
-    /// Leaves out the copies that stand in a stretch of the preview: what the user has made of them is in their memos, which
-    /// stand before `start`, in seconds from the time origin. One that he has taken out of all stretches is his own.
-    void leaveOutFollowed(std::vector<Velmark::Counted<Velmark::IProjectNode>>& copies, const Track& memos,
-                          double start);
+    static std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
+                                                                            const core::SecondsRange& stretch);
+    /// Removes the copies that their memos have followed, wherever they stand: what the user has made of them is in their
+    /// memos, which stand before `start`, in seconds from the time origin. All others that he has edited are his own.
+    void removeFollowed(Velmark::IEditTransaction& transaction, double start);
     /// Removes the automation points in a stretch, in seconds from the time origin, where none follow. Emptying the stretch
     /// would leave one at its start, as the values of the system's own points are rounded. Where others follow, the curve
     /// needs it to go on before the stretch as it did.
@@ -287,6 +291,9 @@ private:
     void copyRange(const std::vector<const Track*>& tracks, double start, double end, double destination);
     void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);
     void moveBack(Velmark::IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end);
+    /// Whether something stands on the tracks in the part of a source that would come to stand before the time origin.
+    bool hasBeforeOrigin(const std::vector<const Track*>& tracks, const core::SecondsRange& source,
+                         double destination) const;
     void writeDestinationMarker(Velmark::IEditTransaction& transaction, const core::EventBase& event);
     void tick(std::uint64_t steps);
 
@@ -307,6 +314,7 @@ private:
     bool m_isOfOtherVersion = false; ///< what is stored, so that it couldn't be read
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;
+    std::vector<std::uint32_t> m_leftOutEvents;
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;

@@ -10,6 +10,7 @@
 #include "core/time/SecondsRange.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
+#include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
 #include "host/track/AutomationCurve.h"
 #include "host/track/CoveredRanges.h"
@@ -169,18 +170,44 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
     const core::EventBase& event = *cut.event();
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
+    bool isLeftOut = false;
     for (const SourceGroup& group : groupsOf(cut)) {
         // There is no room before the begin of the host's timeline. What comes along of a clip that hangs over may reach
         // there, and events may after the time origin has moved.
         const double missing = std::max(timeOrigin() - group.destination, 0.0);
         const double start = group.source.start + missing;
+        isLeftOut = isLeftOut || hasBeforeOrigin(group.tracks, group.source, group.destination);
         if (isBefore(start, group.source.end))
             copyRange(group.tracks, start, group.source.end, group.destination + missing + offset);
     }
+    if (isLeftOut)
+        m_leftOutEvents.push_back(event.eventNumber());
     tick(cut.cutEvents().size());
     const Track& destinations = markerTrack(TrackRole::Destination);
     if (m_model.settings().createDestinationMarkers() && !(destinations.isAlive() && destinations.hostLocked()))
         writeDestinationMarker(transaction, event);
+}
+
+//     time origin                |
+//     new place             |--------------|
+//     left out              |----|
+bool Project::hasBeforeOrigin(const std::vector<const Track*>& tracks, const SecondsRange& source,
+                              double destination) const
+{
+    const double origin = timeOrigin();
+    const double length = source.end - source.start;
+    SecondsRange place{destination, std::min(destination + length, origin)};
+    const core::Settings& settings = m_model.settings();
+    if (settings.restrictRange()) {
+        place.start = std::max(place.start, settings.preserveMaterialBefore());
+        place.end = std::min(place.end, settings.preserveMaterialAfter());
+    }
+    if (!isBefore(place.start, place.end))
+        return false;
+    const double toHost = source.start - destination - origin;
+    return std::ranges::any_of(tracks, [&](const Track* track) {
+        return !eventsReachingInto(*track, place.start + toHost, place.end + toHost).empty();
+    });
 }
 
 void Project::writeDestinationMarker(IEditTransaction& transaction, const core::EventBase& event)

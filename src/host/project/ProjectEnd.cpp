@@ -53,6 +53,9 @@ std::optional<ProjectEnd::PutOff> ProjectEnd::putOff() const
     const std::optional<std::vector<double>> numbers = readNumbers(*root(), AttributeKey::ProjectEnd);
     if (!numbers || numbers->size() != 2)
         return std::nullopt;
+    // It's only ever put off, and none lies before the time origin.
+    if (numbers->front() < 0.0 || numbers->back() < numbers->front())
+        return std::nullopt;
     return PutOff{numbers->front(), numbers->back()};
 }
 

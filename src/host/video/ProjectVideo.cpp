@@ -34,13 +34,13 @@ void ProjectVideo::setProject(Project* project)
     }
 }
 
-bool ProjectVideo::apply(bool write, Velmark::IEditTransaction& transaction, double offset)
+VideoWriting ProjectVideo::apply(bool write, Velmark::IEditTransaction& transaction, double offset)
 {
     if (!m_project)
-        return true;
+        return VideoWriting::Done;
     m_trackHandler.rebuild(m_project);
     m_writer.setOffset(offset);
-    return !write || m_writer.writeVideoEvents(transaction);
+    return write ? m_writer.writeVideoEvents(transaction) : VideoWriting::Done;
 }
 
 } // namespace cadrel::host

@@ -6,6 +6,7 @@
 #include "host/video/TrackVideoSource.h"
 #include "host/video/VideoSourceTrack.h"
 #include "host/video/VideoTrackHandler.h"
+#include "host/video/VideoWriting.h"
 
 namespace Velmark {
 class IEditTransaction;
@@ -29,8 +30,8 @@ public:
     /// Not owned; null for none. A project is taken away before it goes.
     void setProject(Project* project);
     /// Looks for the tracks anew and, with `write`, puts the new videos on theirs, `offset` seconds later than they stand in
-    /// the list. Does nothing without a project. False when they can't be put there because the user has locked the track.
-    bool apply(bool write, Velmark::IEditTransaction& transaction, double offset);
+    /// the list. Does nothing without a project.
+    VideoWriting apply(bool write, Velmark::IEditTransaction& transaction, double offset);
     /// To be called over and over, from the main thread.
     virtual void poll() {}
 

@@ -3,6 +3,7 @@
 #include "host/video/VideoSourceTrack.h"
 
 #include "core/model/VideoList.h"
+#include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
 #include "host/project/MediaPool.h"
@@ -47,35 +48,54 @@ VideoSourceTrack::~VideoSourceTrack()
     m_handler.removeListener(this);
 }
 
-bool VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
+VideoWriting VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
 {
     const core::VideoList* const list = m_source.videoList();
     if (!list || list->isEmpty() || !m_track.isAlive() || VideoTrackHandler::isTurnedOff(m_track))
-        return true;
+        return VideoWriting::Done;
     if (m_track.hostLocked())
-        return false;
-    clear(transaction);
+        return VideoWriting::TrackLocked;
     MediaPool* const pool = m_source.mediaPool();
     if (!pool)
-        return true;
-    const double origin = m_track.timeOrigin();
-    for (const core::VideoList::Entry& entry : list->entries()) {
+        return VideoWriting::NoMediaPool;
+    const std::vector<Video> videos = videosOnTrack(*list);
+    if (videos.empty())
+        return VideoWriting::BeforeProject;
+    clear(transaction);
+    for (const Video& video : videos)
+        insert(transaction, video, pool->findClip(*video.entry));
+    const bool isWhole = videos.size() == list->entries().size() &&
+                         std::ranges::none_of(videos, [](const Video& video) { return video.missing > 0.0; });
+    return isWhole ? VideoWriting::Done : VideoWriting::WithoutBeginning;
+}
+
+std::vector<VideoSourceTrack::Video> VideoSourceTrack::videosOnTrack(const core::VideoList& list) const
+{
+    // A preview shows what a run writes.
+    const double begin = m_track.timeOrigin() + m_offset;
+    std::vector<Video> videos;
+    for (const core::VideoList::Entry& entry : list.entries()) {
         const double start = m_offset + entry.start.toSeconds();
         const double length = entry.length.toSeconds();
-        const double missing = isBefore(start, origin) ? origin - start : 0.0;
+        const double missing = isBefore(start, begin) ? begin - start : 0.0;
         if (missing > 0.0 && !isBefore(missing, length))
             continue;
-        HostEvent event(m_track, required(create<IProjectNode>(m_hostContext, ClassId::ClipEvent)));
-        const double possible = std::max(start, origin);
-        event.setStart(transaction, possible);
-        event.setEnd(transaction, possible + length);
-        event.setClip(pool->findClip(entry).get(), 0);
-        if (missing > 0.0)
-            insertWithoutStart(transaction, *event.node(), missing);
-        else
-            requireOk(transaction.insert(m_track.container().get(), event.node()));
+        const double possible = std::max(start, begin);
+        videos.push_back({&entry, {possible, possible + length}, missing});
     }
-    return true;
+    return videos;
+}
+
+void VideoSourceTrack::insert(IEditTransaction& transaction, const Video& video, const Counted<IMediaClip>& clip)
+{
+    HostEvent event(m_track, required(create<IProjectNode>(m_hostContext, ClassId::ClipEvent)));
+    event.setStart(transaction, video.place.start);
+    event.setEnd(transaction, video.place.end);
+    event.setClip(clip.get(), 0);
+    if (video.missing > 0.0)
+        insertWithoutStart(transaction, *event.node(), video.missing);
+    else
+        requireOk(transaction.insert(m_track.container().get(), event.node()));
 }
 
 //     the list              |------ picture -----|
@@ -84,19 +104,26 @@ bool VideoSourceTrack::writeVideoEvents(IEditTransaction& transaction)
 //     written                   |-- picture -----|
 void VideoSourceTrack::insertWithoutStart(IEditTransaction& transaction, IProjectNode& event, double missing)
 {
-    const double length = event.getEnd(nullptr);
+    const double start = event.getStart(nullptr);
+    const double end = event.getEnd(nullptr);
     const auto document = documentOf(m_track);
     const auto root = required(Counted<FUnknown>::adopt(document->getContainer(nullptr)));
     const auto track = required(Counted<FUnknown>::adopt(document->createTrack(TypeWord::Video)));
     requireOk(transaction.insert(root.get(), track.get()));
-    requireOk(transaction.insert(track.get(), &event));
-    const auto list = required(create<IObjectList>(m_hostContext));
-    requireOk(list->add(track.get(), 0));
-    requireOk(
-        required(service<IEditService>(m_hostContext))->copyRange(document.get(), list.get(), 0, missing, length, 0.0));
-    const auto pieces = childrenOf(*required(query<IProjectNode>(track)));
-    requireOk(transaction.move(track.get(), m_track.container().get(), required(pieces.front().get())));
-    requireOk(transaction.remove(root.get(), track.get()));
+    FirstFailure failure;
+    failure.ofStep([&] {
+        requireOk(transaction.insert(track.get(), &event));
+        const auto list = required(create<IObjectList>(m_hostContext));
+        requireOk(list->add(track.get(), 0));
+        requireOk(required(service<IEditService>(m_hostContext))
+                      ->copyRange(document.get(), list.get(), 0, start + missing, end, start));
+        const auto pieces = childrenOf(*required(query<IProjectNode>(track)));
+        if (pieces.empty())
+            throw util::Result::HostObjectMissing;
+        requireOk(transaction.move(track.get(), m_track.container().get(), pieces.front().get()));
+    });
+    failure.ofStep([&] { requireOk(transaction.remove(root.get(), track.get())); });
+    failure.raise();
 }
 
 void VideoSourceTrack::clear(IEditTransaction& transaction)

@@ -27,12 +27,15 @@ public:
     bool removes = true;
     bool closes = true;
     bool deletes = true;
+    std::function<bool()> copies = [] { return true; };
     std::function<void()> beforeDelete = [] {};
     std::function<bool(Velmark::IEditStep*)> addsStep = [](Velmark::IEditStep*) { return true; };
 
     Velmark::int32 copyRange(Velmark::IProjectDocument* project, Velmark::IObjectList* tracks, Velmark::int32 reserved,
                              double start, double end, double destination) override
     {
+        if (!copies())
+            return Refused;
         return m_service->copyRange(project, tracks, reserved, start, end, destination);
     }
     Velmark::int32 closeRange(Velmark::IProjectDocument* project, Velmark::IObjectList* tracks, double start,

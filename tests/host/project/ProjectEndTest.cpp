@@ -134,6 +134,25 @@ TEST_F(ProjectEndTest, StaysWhereThePreviewIsThereAndTheSetEndCannotBeTold)
     EXPECT_FALSE(kept());
 }
 
+TEST_F(ProjectEndTest, ForgetsWhatCannotHaveBeenKept)
+{
+    for (const Numbers& stored :
+         {Numbers{-1.0, 1000.0}, Numbers{1000.1, 1000.0}, Numbers{1e300, 1000.0}, Numbers{-2.0, -1.0}}) {
+        SCOPED_TRACE(stored.front());
+        set(1000.0);
+        writeNumbers(host.context(), *host.root(), AttributeKey::ProjectEnd, stored);
+
+        end.putBack();
+        EXPECT_EQ(present(), 1000.0);
+        EXPECT_FALSE(kept());
+
+        writeNumbers(host.context(), *host.root(), AttributeKey::ProjectEnd, stored);
+        end.putOffTo(2000.0, false);
+        EXPECT_EQ(kept(), (Numbers{1000.0, 2000.0}));
+        end.putBack();
+    }
+}
+
 TEST_F(ProjectEndTest, IsNoLongerKeptWhereTheHostRefusesIt)
 {
     const auto altered = makeCounted<tests::AlteredDocument>(host.document());

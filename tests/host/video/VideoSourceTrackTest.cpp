@@ -6,6 +6,7 @@
 #include "host/border/HostFailure.h"
 #include "host/video/PoolVideoSource.h"
 #include "host/video/VideoTrackHandler.h"
+#include "tests/host/project/AlteredEdits.h"
 #include "tests/support/host/AlteredContext.h"
 #include "tests/support/host/VideoHost.h"
 #include "velmark/ClassId.h"
@@ -52,11 +53,11 @@ protected:
     }
     ~VideoSourceTrackTest() override { source.setVideoList(nullptr); }
 
-    bool write()
+    VideoWriting write()
     {
-        bool isWritten = false;
-        host.edit(u"Write", [&] { isWritten = writer.writeVideoEvents(*host.transaction()); });
-        return isWritten;
+        VideoWriting writing{};
+        host.edit(u"Write", [&] { writing = writer.writeVideoEvents(*host.transaction()); });
+        return writing;
     }
     std::vector<Written> written(const VideoHost::Node& track)
     {
@@ -84,7 +85,7 @@ INSTANTIATE_TEST_SUITE_P(Origins, VideoSourceTrackTest, testing::Values(0.0, 360
 
 TEST_P(VideoSourceTrackTest, WritesEachVideoOfTheListWhereItStands)
 {
-    write();
+    EXPECT_EQ(write(), VideoWriting::Done);
 
     EXPECT_EQ(written(newTrack), (std::vector<Written>{{10.0, 14.0, &reel3}, {14.0, 16.0, &reel4}}));
     EXPECT_TRUE(written(oldTrack).empty());
@@ -116,7 +117,7 @@ TEST_P(VideoSourceTrackTest, ReplacesWhatStoodOnTheTrack)
 
 TEST_P(VideoSourceTrackTest, WithAnOffsetReplacesOnlyWhatStartsThereOrLater)
 {
-    // Half a minute later than the clock's beginning; the first video is written ten seconds behind that.
+    // Half a minute later than the clock's beginning; the video is written ten seconds after that, and the time origin.
     writer.setOffset(host.clock(30.0));
     host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
     host.addVideoEvent(newTrack, reel4, 27.96, 29.96);
@@ -124,13 +125,14 @@ TEST_P(VideoSourceTrackTest, WithAnOffsetReplacesOnlyWhatStartsThereOrLater)
     host.addVideoEvent(newTrack, reel4, 40.0, 42.0);
     host.addPart(newTrack, u"part", 100.0, 200.0);
     list.clear();
-    list.add(VideoList::Entry("/picture/reel3_v12.mov", Timecode(10.0), Timecode(0, 0, 4, 0)), false);
+    list.add(VideoList::Entry("/picture/reel3_v12.mov", Timecode(host.clock(10.0)), Timecode(0, 0, 4, 0)), false);
 
     write();
 
-    EXPECT_EQ(written(newTrack),
-              (std::vector<Written>{
-                  {0.0, 2.0, &reel4}, {27.96, 29.96, &reel4}, {29.96, 31.96, &reel4}, {40.0, 44.0, &reel3}}));
+    EXPECT_EQ(written(newTrack), (std::vector<Written>{{0.0, 2.0, &reel4},
+                                                       {27.96, 29.96, &reel4},
+                                                       {29.96, 31.96, &reel4},
+                                                       {host.clock(40.0), host.clock(44.0), &reel3}}));
 
     write();
     EXPECT_EQ(written(newTrack).size(), 4U);
@@ -139,15 +141,15 @@ TEST_P(VideoSourceTrackTest, WithAnOffsetReplacesOnlyWhatStartsThereOrLater)
 TEST_P(VideoSourceTrackTest, WhatStartsExactlyAtTheOffsetIsReplaced)
 {
     writer.setOffset(host.clock(30.0));
-    source.setMediaPool(nullptr);
     list.clear();
-    list.add(VideoList::Entry("/picture/reel3_v12.mov", Timecode(10.0), Timecode(0, 0, 4, 0)), false);
+    list.add(VideoList::Entry("/picture/reel3_v12.mov", Timecode(host.clock(10.0)), Timecode(0, 0, 4, 0)), false);
     host.addVideoEvent(newTrack, reel4, 29.96, 30.0);
     host.addVideoEvent(newTrack, reel4, 30.0, 32.0);
 
     write();
 
-    EXPECT_EQ(written(newTrack), (std::vector<Written>{{29.96, 30.0, &reel4}}));
+    EXPECT_EQ(written(newTrack),
+              (std::vector<Written>{{29.96, 30.0, &reel4}, {host.clock(40.0), host.clock(44.0), &reel3}}));
 }
 
 TEST_P(VideoSourceTrackTest, LeavesATrackAloneThatTheUserHasLocked)
@@ -156,11 +158,11 @@ TEST_P(VideoSourceTrackTest, LeavesATrackAloneThatTheUserHasLocked)
     requireOk(query<ITrackNode>(newTrack)->setFlag(TrackFlag::Lock, true));
     const std::string before = host.dump();
 
-    EXPECT_FALSE(write());
+    EXPECT_EQ(write(), VideoWriting::TrackLocked);
 
     EXPECT_EQ(host.dump(), before);
     list.clear();
-    EXPECT_TRUE(write()) << "There is nothing to write.";
+    EXPECT_EQ(write(), VideoWriting::Done) << "There is nothing to write.";
 }
 
 TEST_P(VideoSourceTrackTest, NeverWritesOnATrackWithoutARole)
@@ -219,7 +221,7 @@ TEST_P(VideoSourceTrackTest, LeavesATrackAloneOnWhichTheUserHasPutAnotherVideo)
 
     for (const double offset : {0.0, 86400.0}) {
         writer.setOffset(offset);
-        EXPECT_TRUE(write());
+        EXPECT_EQ(write(), VideoWriting::Done);
         EXPECT_EQ(host.dump(), before);
     }
 }
@@ -248,14 +250,15 @@ TEST_P(VideoSourceTrackTest, AVideoThatIsNotInThePoolIsAnEventWithoutAClip)
               (std::vector<Written>{{10.0, 14.0, &reel3}, {14.0, 16.0, &reel4}, {20.0, 21.0, nullptr}}));
 }
 
-TEST_P(VideoSourceTrackTest, WithoutAPoolTheTrackIsEmptied)
+TEST_P(VideoSourceTrackTest, WithoutAPoolTheTrackStaysAsItIs)
 {
     host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
     source.setMediaPool(nullptr);
+    const std::string before = host.dump();
 
-    write();
+    EXPECT_EQ(write(), VideoWriting::NoMediaPool);
 
-    EXPECT_TRUE(written(newTrack).empty());
+    EXPECT_EQ(host.dump(), before);
 }
 
 TEST_P(VideoSourceTrackTest, WritesOnTheTrackThatHasThePictureNow)
@@ -277,39 +280,88 @@ TEST_P(VideoSourceTrackTest, ReportsWhatTheHostRefuses)
 
 TEST_P(VideoSourceTrackTest, WritesOfAVideoWhatDoesNotLieBeforeTheBeginningOfTheProject)
 {
-    // The one stands from 10 s to 14 s, the other from 14 s to 16 s.
+    // By a time origin that has moved by so much, the one stands from 10 s to 14 s, the other from 14 s to 16 s.
     struct Case {
-        double offset;
+        double moved;
+        VideoWriting writing;
         std::vector<Written> written;
         double firstPlaysFrom;
     };
     for (const Case& at :
-         {Case{-10.0, {{0.0, 4.0, &reel3}, {4.0, 6.0, &reel4}}, 0.0},
-          Case{-10.04, {{0.0, 3.96, &reel3}, {3.96, 5.96, &reel4}}, 0.04},
-          Case{-13.96, {{0.0, 0.04, &reel3}, {0.04, 2.04, &reel4}}, 3.96}, Case{-14.0, {{0.0, 2.0, &reel4}}, 0.0},
-          Case{-15.5, {{0.0, 0.5, &reel4}}, 1.5}, Case{-16.0, {}, 0.0}, Case{-20.0, {}, 0.0}}) {
-        SCOPED_TRACE(at.offset);
-        writer.setOffset(at.offset);
-        const std::string before = host.dump();
+         {Case{10.0, VideoWriting::Done, {{0.0, 4.0, &reel3}, {4.0, 6.0, &reel4}}, 0.0},
+          Case{10.04, VideoWriting::WithoutBeginning, {{0.0, 3.96, &reel3}, {3.96, 5.96, &reel4}}, 0.04},
+          Case{13.96, VideoWriting::WithoutBeginning, {{0.0, 0.04, &reel3}, {0.04, 2.04, &reel4}}, 3.96},
+          Case{14.0, VideoWriting::WithoutBeginning, {{0.0, 2.0, &reel4}}, 0.0},
+          Case{15.5, VideoWriting::WithoutBeginning, {{0.0, 0.5, &reel4}}, 1.5}}) {
+        for (const double offset : {0.0, 86400.0}) {
+            SCOPED_TRACE(at.moved + offset);
+            host.project.setTimeOrigin(host.origin + at.moved);
+            writer.setOffset(offset);
+            const std::string before = host.dump();
 
-        EXPECT_TRUE(write());
+            EXPECT_EQ(write(), at.writing);
 
-        const std::vector<Written> found = written(newTrack);
-        ASSERT_EQ(found.size(), at.written.size());
-        for (std::size_t index = 0; index < found.size(); ++index) {
-            EXPECT_NEAR(found[index].start, at.written[index].start, 1e-9);
-            EXPECT_NEAR(found[index].end, at.written[index].end, 1e-9);
-            EXPECT_EQ(found[index].clip, at.written[index].clip);
-            EXPECT_NEAR(standin::tests::childrenOf(*newTrack)[index]->getSourceOffset(nullptr),
-                        index == 0 ? at.firstPlaysFrom : 0.0, 1e-9);
-        }
-        EXPECT_TRUE(written(oldTrack).empty());
-        EXPECT_EQ(standin::tests::childrenOf(*host.root()).size(), 2U);
-        if (host.dump() != before) {
+            const std::vector<Written> found = written(newTrack);
+            ASSERT_EQ(found.size(), at.written.size());
+            for (std::size_t index = 0; index < found.size(); ++index) {
+                EXPECT_NEAR(found[index].start, at.written[index].start + offset, 1e-9);
+                EXPECT_NEAR(found[index].end, at.written[index].end + offset, 1e-9);
+                EXPECT_EQ(found[index].clip, at.written[index].clip);
+                EXPECT_NEAR(standin::tests::childrenOf(*newTrack)[index]->getSourceOffset(nullptr),
+                            index == 0 ? at.firstPlaysFrom : 0.0, 1e-9);
+            }
+            EXPECT_TRUE(written(oldTrack).empty());
+            EXPECT_EQ(standin::tests::childrenOf(*host.root()).size(), 2U);
             ASSERT_TRUE(host.undo());
+            EXPECT_EQ(host.dump(), before);
         }
-        EXPECT_EQ(host.dump(), before);
     }
+}
+
+TEST_P(VideoSourceTrackTest, LeavesTheTrackAloneWhereAllOfTheVideoLiesBeforeTheBeginningOfTheProject)
+{
+    host.addVideoEvent(newTrack, reel4, 0.0, 2.0);
+    host.addVideoEvent(newTrack, reel4, 86400.0, 86402.0);
+    for (const double moved : {16.0, 20.0}) {
+        for (const double offset : {0.0, 86400.0}) {
+            SCOPED_TRACE(moved + offset);
+            host.project.setTimeOrigin(host.origin + moved);
+            writer.setOffset(offset);
+            const std::string before = host.dump();
+
+            EXPECT_EQ(write(), VideoWriting::BeforeProject);
+
+            EXPECT_EQ(host.dump(), before);
+        }
+    }
+}
+
+TEST_P(VideoSourceTrackTest, LeavesNoTrackBehindWhereItCannotCutAVideo)
+{
+    host.project.setTimeOrigin(host.origin + 12.0);
+    tests::AlteredContext context(host.context());
+    const auto edits = makeCounted<tests::AlteredEdits>(host.context());
+    context.replace(IEditService::iid, edits);
+    VideoSourceTrack another(&context, source, handler, Mode::New);
+    const auto writeThere = [&] {
+        Result::Type result = Result::Ok;
+        host.edit(u"Write", [&] { result = resultOf([&] { another.writeVideoEvents(*host.transaction()); }); });
+        return result;
+    };
+    const auto emptyLastTrack = [&] {
+        const auto track = standin::tests::childrenOf(*host.root()).back();
+        for (const auto& child : standin::tests::childrenOf(*track))
+            requireOk(host.transaction()->remove(track.get(), child.get()));
+        return true;
+    };
+
+    edits->copies = [] { return false; };
+    EXPECT_EQ(writeThere(), Result::HostCallFailed);
+    EXPECT_EQ(standin::tests::childrenOf(*host.root()).size(), 2U);
+
+    edits->copies = emptyLastTrack;
+    EXPECT_EQ(writeThere(), Result::HostObjectMissing);
+    EXPECT_EQ(standin::tests::childrenOf(*host.root()).size(), 2U);
 }
 
 TEST_P(VideoSourceTrackTest, MissesEventsWhereTheHostMakesNone)
