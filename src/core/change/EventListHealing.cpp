@@ -4,15 +4,16 @@
 
 #include "core/change/HealCheck.h"
 #include "core/change/HealProcessing.h"
-#include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/HealedEvent.h"
+#include "core/edl/ProgrammeOrder.h"
 #include "core/settings/Settings.h"
 #include "util/Result.h"
 
 #include <algorithm>
-#include <functional>
+#include <iterator>
+#include <unordered_set>
 #include <utility>
 #include <vector>
 
@@ -22,60 +23,50 @@ using util::Result;
 
 namespace {
 
-/// The events of `events` that are in `selected`, in the list's order; a healed event is taken apart into its members.
-EventList withoutHealing(const EventList& events, const CutMap& selected)
+using Events = std::vector<std::shared_ptr<EventBase>>;
+using EventSet = std::unordered_set<const EventBase*>;
+
+/// The events whose timecodes are usable.
+EventSet timedOf(const Events& events)
 {
-    std::vector<std::shared_ptr<EventBase>> taken;
+    EventSet set;
+    set.reserve(events.size());
+    for (const auto& event : events) {
+        if (!event->hasFlaw(EventFlaw::TimecodeInvalid))
+            set.insert(event.get());
+    }
+    return set;
+}
+
+/// The events of `events` that are in `selected`, in the list's order; a healed event is taken apart into its members.
+Events withoutHealing(const EventList& events, const EventSet& selected)
+{
+    Events taken;
+    taken.reserve(selected.size());
     for (const auto& event : events.events()) {
-        if (!selected.contains(event))
+        if (!selected.contains(event.get()))
             continue;
-        if (const auto healed = std::dynamic_pointer_cast<HealedEvent>(event))
+        if (const auto* const healed = dynamic_cast<const HealedEvent*>(event.get()))
             taken.insert(taken.end(), healed->healedEvents().events().begin(), healed->healedEvents().events().end());
         else
             taken.push_back(event);
     }
-    EventList list;
-    list.append(std::move(taken));
-    return list;
+    return taken;
 }
 
 /// Removes the events with invalid timecodes, because healing would drop them.
-EventList takeUntimed(EventList& events)
+Events takeUntimed(Events& events)
 {
-    EventList untimed;
-    for (const auto& event : events.events()) {
-        if (event->hasFlaw(EventFlaw::TimecodeInvalid))
-            untimed.add(event);
-    }
-    events.remove(untimed);
-    return untimed;
+    const auto untimed = std::stable_partition(
+        events.begin(), events.end(), [](const auto& event) { return !event->hasFlaw(EventFlaw::TimecodeInvalid); });
+    Events taken(std::make_move_iterator(untimed), std::make_move_iterator(events.end()));
+    events.erase(untimed, events.end());
+    return taken;
 }
 
-/// Whether two neighbours in the selection have other events between them in the whole list.
-bool isFragmented(const CutMap& selected, const EventList& list)
+bool isHealed(const EventBase& event)
 {
-    // It has no neighbours then, and the list may be long.
-    if (selected.dstInOrder().size() < 2)
-        return false;
-    const CutMap whole(list, Timecode::framerate());
-    using Neighbours = std::pair<const EventBase*, const EventBase*>;
-    const auto neighboursOf = [](const CutMap& map) {
-        std::vector<Neighbours> neighbours;
-        neighbours.reserve(map.dstInOrder().size());
-        const EventBase* previous = nullptr;
-        for (const CutEntry& entry : map.dstInOrder()) {
-            const EventBase* const event = entry.event.lock().get();
-            if (previous != nullptr)
-                neighbours.emplace_back(previous, event);
-            previous = event;
-        }
-        std::sort(neighbours.begin(), neighbours.end());
-        neighbours.erase(std::unique(neighbours.begin(), neighbours.end()), neighbours.end());
-        return neighbours;
-    };
-    const std::vector<Neighbours> inSelection = neighboursOf(selected);
-    const std::vector<Neighbours> inWhole = neighboursOf(whole);
-    return !std::includes(inWhole.begin(), inWhole.end(), inSelection.begin(), inSelection.end());
+    return dynamic_cast<const HealedEvent*>(&event) != nullptr;
 }
 
 HealContext makeContext(const EventList& referenceList, const Settings& settings)
@@ -86,19 +77,18 @@ HealContext makeContext(const EventList& referenceList, const Settings& settings
 /// The event before or after `event` in the order of DST IN; null when there is none or the list doesn't hold it.
 std::shared_ptr<EventBase> neighbourOf(const EventList& events, const std::shared_ptr<EventBase>& event, bool previous)
 {
-    const CutMap map(events, Timecode::framerate());
-    if (!map.contains(event))
+    if (!events.contains(event) || event->hasFlaw(EventFlaw::TimecodeInvalid))
         return nullptr;
-    const auto& order = map.dstInOrder();
-    const Timecode& key = event->dstIn();
+    const std::vector<PlacedEvent> order = inProgrammeOrder(events.events(), Timecode::framerate());
+    const std::int32_t key = event->dstIn().toFrameCount();
     if (previous) {
-        const auto place =
-            std::partition_point(order.begin(), order.end(), [&](const CutEntry& entry) { return entry.time < key; });
-        return place == order.begin() ? nullptr : std::prev(place)->event.lock();
+        const auto place = std::partition_point(order.begin(), order.end(),
+                                                [&](const PlacedEvent& other) { return other.dstIn < key; });
+        return place == order.begin() ? nullptr : events.eventAt(std::prev(place)->index);
     }
     const auto place =
-        std::partition_point(order.begin(), order.end(), [&](const CutEntry& entry) { return !(entry.time > key); });
-    return place == order.end() ? nullptr : place->event.lock();
+        std::partition_point(order.begin(), order.end(), [&](const PlacedEvent& other) { return other.dstIn <= key; });
+    return place == order.end() ? nullptr : events.eventAt(place->index);
 }
 
 } // namespace
@@ -114,18 +104,20 @@ void EventList::heal(const EventList& selection, const EventList& referenceList,
 
 void EventList::healSelection(const EventList& selection, const EventList& referenceList, std::int32_t healMode)
 {
-    const CutMap selected(selection, Timecode::framerate());
-    EventList healed = withoutHealing(*this, selected);
-    const EventList untimed = takeUntimed(healed);
+    const EventSet selected = timedOf(selection.events());
+    Events collected = withoutHealing(*this, selected);
+    const Events untimed = takeUntimed(collected);
+    EventList healed;
+    healed.append(std::move(collected));
     Settings settings;
     settings.setHealMode(healMode);
     HealProcessing().process(healed, makeContext(referenceList, settings));
 
-    std::vector<std::shared_ptr<EventBase>> all;
+    Events all;
     std::remove_copy_if(m_events.begin(), m_events.end(), std::back_inserter(all),
-                        [&](const auto& event) { return selected.contains(event); });
+                        [&](const auto& event) { return selected.contains(event.get()); });
     all.insert(all.end(), healed.events().begin(), healed.events().end());
-    all.insert(all.end(), untimed.events().begin(), untimed.events().end());
+    all.insert(all.end(), untimed.begin(), untimed.end());
     std::sort(all.begin(), all.end(), [](const auto& a, const auto& b) { return a->dstIn() < b->dstIn(); });
 
     std::vector<std::pair<HealedEvent*, std::string>> names;
@@ -143,12 +135,37 @@ void EventList::healSelection(const EventList& selection, const EventList& refer
         event->setRollName(name);
 }
 
-HealCheck::HealCheck(const EventList& list, const EventList& selection, const EventList& referenceList)
-    : m_referenceList(referenceList), m_selectedCount(selection.size()), m_selected(selection, Timecode::framerate()),
-      m_isFragmented(isFragmented(m_selected, list)),
-      m_collected(m_isFragmented ? EventList() : withoutHealing(list, m_selected)),
-      m_untimed(takeUntimed(m_collected).size())
+HealCheck::HealCheck(const EventList& list, const std::vector<std::shared_ptr<EventBase>>& selection,
+                     const EventList& referenceList)
+    : m_referenceList(referenceList), m_selectedCount(selection.size())
 {
+    const EventSet selected = timedOf(selection);
+    // One event has no neighbours, and the list may be long.
+    if (selected.size() < 2 || !collectRun(list, selected))
+        collectWithoutHealing(list, selected);
+}
+
+/// Takes the selected events where they follow each other and none of them is healed. False for a healed one.
+bool HealCheck::collectRun(const EventList& list, const std::unordered_set<const EventBase*>& selected)
+{
+    const auto isSelected = [&](const PlacedEvent& placed) { return selected.contains(&list.at(placed.index)); };
+    const std::vector<PlacedEvent> whole = inProgrammeOrder(list.events(), Timecode::framerate());
+    const auto first = std::find_if(whole.begin(), whole.end(), isSelected);
+    const auto end = std::find_if_not(first, whole.end(), isSelected);
+    m_isFragmented = static_cast<std::size_t>(end - first) != selected.size();
+    if (m_isFragmented)
+        return true;
+    if (std::any_of(first, end, [&](const PlacedEvent& placed) { return isHealed(list.at(placed.index)); }))
+        return false;
+    m_collected.assign(first, end);
+    return true;
+}
+
+void HealCheck::collectWithoutHealing(const EventList& list, const std::unordered_set<const EventBase*>& selected)
+{
+    Events collected = withoutHealing(list, selected);
+    m_untimed = takeUntimed(collected).size();
+    m_collected = inProgrammeOrder(collected, Timecode::framerate());
 }
 
 bool HealCheck::canHeal(std::int32_t healMode) const
@@ -163,7 +180,7 @@ bool HealCheck::canHeal(std::int32_t healMode) const
 
 bool EventList::canHeal(const EventList& selection, const EventList& referenceList, std::int32_t healMode) const
 {
-    return HealCheck(*this, selection, referenceList).canHeal(healMode);
+    return HealCheck(*this, selection.events(), referenceList).canHeal(healMode);
 }
 
 void EventList::extendEvent(const std::shared_ptr<EventBase>& event, bool previous)

@@ -2,11 +2,14 @@
 
 #pragma once
 
-#include "core/edl/CutMap.h"
 #include "core/edl/EventList.h"
+#include "core/edl/ProgrammeOrder.h"
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
+#include <unordered_set>
+#include <vector>
 
 namespace cadrel::core {
 
@@ -14,19 +17,22 @@ namespace cadrel::core {
 /// reference list has to outlive it; changes of the others are not followed.
 class HealCheck {
 public:
-    /// Throws what Timecode::toSeconds throws.
-    HealCheck(const EventList& list, const EventList& selection, const EventList& referenceList);
+    /// Throws what Timecode::toFrameCount throws.
+    HealCheck(const EventList& list, const std::vector<std::shared_ptr<EventBase>>& selection,
+              const EventList& referenceList);
 
     /// As EventList::canHeal.
     bool canHeal(std::int32_t healMode) const;
 
 private:
+    bool collectRun(const EventList& list, const std::unordered_set<const EventBase*>& selected);
+    void collectWithoutHealing(const EventList& list, const std::unordered_set<const EventBase*>& selected);
+
     const EventList& m_referenceList;
     std::size_t m_selectedCount;
-    CutMap m_selected;
-    bool m_isFragmented;
-    EventList m_collected; ///< the selected events with usable timecodes, without healing
-    std::size_t m_untimed; ///< how many others are selected
+    bool m_isFragmented = false;
+    std::vector<PlacedEvent> m_collected; ///< without healing, in programme order; none with unusable timecodes
+    std::size_t m_untimed = 0;            ///< how many others are selected
 };
 
 } // namespace cadrel::core

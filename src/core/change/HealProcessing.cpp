@@ -6,6 +6,7 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/HealedEvent.h"
+#include "core/edl/ProgrammeOrder.h"
 #include "core/settings/Settings.h"
 #include "util/StringUtil.h"
 
@@ -17,34 +18,22 @@ namespace cadrel::core {
 
 namespace {
 
-/// The events of a list in the order of DST IN, and which of them need no cut between them.
-class JoinableEvents {
+/// Tells which neighbours in programme order need no cut between them.
+class Joining {
 public:
-    JoinableEvents(const EventList& events, const HealContext& context)
-        : m_mode(context.settings->healMode()), m_framerate(context.framerate)
+    explicit Joining(const HealContext& context) : m_mode(context.settings->healMode()), m_framerate(context.framerate)
     {
         if (m_mode == HealMode::GapsWithoutInserts)
             m_references.emplace(*context.referenceList, m_framerate);
-        const CutMap map(events, m_framerate);
-        for (const CutEntry& entry : map.dstInOrder())
-            m_events.push_back(entry.event.lock());
     }
 
-    const std::vector<std::shared_ptr<EventBase>>& events() const { return m_events; }
-
-    bool joinsNext(std::size_t index) const
+    bool canJoin(const PlacedEvent& earlier, const PlacedEvent& later) const
     {
-        return index + 1 < m_events.size() && canJoin(*m_events[index], *m_events[index + 1]);
-    }
-
-private:
-    bool canJoin(const EventBase& earlier, const EventBase& later) const
-    {
-        if (later.srcIn() < earlier.srcOut() || later.dstIn() < earlier.dstOut())
+        if (later.srcIn < earlier.srcOut || later.dstIn < earlier.dstOut)
             return false;
         switch (m_mode) {
         case HealMode::Normal:
-            return later.srcIn() == earlier.srcOut() && later.dstIn() == earlier.dstOut();
+            return later.srcIn == earlier.srcOut && later.dstIn == earlier.dstOut;
         case HealMode::GapsWithoutInserts:
             return haveSameGaps(earlier, later) && !hasInsertBetween(earlier, later);
         case HealMode::GapsWithInserts:
@@ -54,18 +43,20 @@ private:
         }
     }
 
-    static bool haveSameGaps(const EventBase& earlier, const EventBase& later)
+private:
+    static bool haveSameGaps(const PlacedEvent& earlier, const PlacedEvent& later)
     {
-        return later.srcIn() - earlier.srcOut() == later.dstIn() - earlier.dstOut();
+        return later.srcIn - earlier.srcOut == later.dstIn - earlier.dstOut;
     }
 
-    bool hasInsertBetween(const EventBase& earlier, const EventBase& later) const
+    bool hasInsertBetween(const PlacedEvent& earlier, const PlacedEvent& later) const
     {
-        const auto inGap = m_references->eventsInDestinationRange(earlier.dstOut().toSeconds(m_framerate),
-                                                                  later.dstIn().toSeconds(m_framerate));
+        const auto inGap =
+            m_references->eventsInDestinationRange(earlier.dstOut / m_framerate.rate, later.dstIn / m_framerate.rate);
         for (const auto& entry : inGap) {
             const std::shared_ptr<EventBase> reference = entry.lock();
-            const bool onlyTouches = reference->dstOut() == earlier.dstOut() || reference->dstIn() == later.dstIn();
+            const bool onlyTouches = reference->dstOut().toFrameCount(m_framerate) == earlier.dstOut ||
+                                     reference->dstIn().toFrameCount(m_framerate) == later.dstIn;
             if (!onlyTouches)
                 return true;
         }
@@ -75,12 +66,11 @@ private:
     std::int32_t m_mode;
     Framerate m_framerate;
     std::optional<CutMap> m_references; ///< only for the mode that asks for inserts
-    std::vector<std::shared_ptr<EventBase>> m_events;
 };
 
-bool hasNothingToHeal(const EventList& events, const HealContext& context)
+bool hasNothingToHeal(std::size_t count, const HealContext& context)
 {
-    return context.settings->healMode() == HealMode::None || events.size() < 2;
+    return context.settings->healMode() == HealMode::None || count < 2;
 }
 
 std::shared_ptr<HealedEvent> makeHealedEvent(std::size_t count, std::int32_t matchBy)
@@ -98,16 +88,17 @@ std::shared_ptr<HealedEvent> makeHealedEvent(std::size_t count, std::int32_t mat
 
 void HealProcessing::process(EventList& events, const HealContext& context) const
 {
-    if (hasNothingToHeal(events, context))
+    if (hasNothingToHeal(events.size(), context))
         return;
-    const JoinableEvents joinable(events, context);
+    const Joining joining(context);
+    const std::vector<PlacedEvent> ordered = inProgrammeOrder(events.events(), context.framerate);
     EventList result;
     std::shared_ptr<HealedEvent> open;
     std::uint32_t number = 1;
     std::size_t healedCount = 1;
-    for (std::size_t index = 0; index < joinable.events().size(); ++index) {
-        const std::shared_ptr<EventBase>& current = joinable.events()[index];
-        const bool joinsNext = joinable.joinsNext(index);
+    for (std::size_t index = 0; index < ordered.size(); ++index) {
+        const std::shared_ptr<EventBase> current = events.eventAt(ordered[index].index);
+        const bool joinsNext = index + 1 < ordered.size() && joining.canJoin(ordered[index], ordered[index + 1]);
         if (joinsNext && !open)
             open = makeHealedEvent(healedCount++, context.settings->matchBy());
         if (open)
@@ -123,14 +114,14 @@ void HealProcessing::process(EventList& events, const HealContext& context) cons
     events.append(result);
 }
 
-std::size_t HealProcessing::countAfter(const EventList& events, const HealContext& context) const
+std::size_t HealProcessing::countAfter(const std::vector<PlacedEvent>& ordered, const HealContext& context) const
 {
-    if (hasNothingToHeal(events, context))
-        return events.size();
-    const JoinableEvents joinable(events, context);
-    std::size_t count = 0;
-    for (std::size_t index = 0; index < joinable.events().size(); ++index)
-        count += joinable.joinsNext(index) ? 0 : 1;
+    if (hasNothingToHeal(ordered.size(), context))
+        return ordered.size();
+    const Joining joining(context);
+    std::size_t count = ordered.size();
+    for (std::size_t index = 1; index < ordered.size(); ++index)
+        count -= joining.canJoin(ordered[index - 1], ordered[index]) ? 1 : 0;
     return count;
 }
 

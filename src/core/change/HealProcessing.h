@@ -6,8 +6,11 @@
 
 #include <cstddef>
 #include <string>
+#include <vector>
 
 namespace cadrel::core {
+
+struct PlacedEvent;
 
 /// Joins neighbours of a change EDL that need no cut between them into HealedEvents, by the heal mode of the settings:
 ///
@@ -23,8 +26,9 @@ public:
     /// may have new numbers.
     void process(EventList& events, const HealContext& context) const override;
 
-    /// The number of events that `process` would leave. Changes nothing; throws as `process`.
-    std::size_t countAfter(const EventList& events, const HealContext& context) const;
+    /// The number of events that `process` would leave of these, which are in the order of inProgrammeOrder. Changes nothing;
+    /// throws as `process`.
+    std::size_t countAfter(const std::vector<PlacedEvent>& ordered, const HealContext& context) const;
 
     /// "Healed Event 001", translated.
     static std::string healedEventName(std::size_t count);

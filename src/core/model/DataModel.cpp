@@ -29,9 +29,11 @@ using Events = std::vector<std::shared_ptr<EventBase>>;
 std::unordered_set<const EventBase*> membersOf(const EventList& list, const Events& events)
 {
     std::unordered_set<const EventBase*> wanted;
+    wanted.reserve(events.size());
     for (const auto& event : events)
         wanted.insert(event.get());
     std::unordered_set<const EventBase*> members;
+    members.reserve(wanted.size());
     for (const auto& event : list.events()) {
         if (wanted.contains(event.get()))
             members.insert(event.get());

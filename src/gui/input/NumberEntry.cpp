@@ -2,6 +2,7 @@
 
 #include "gui/input/NumberEntry.h"
 
+#include <algorithm>
 #include <array>
 #include <charconv>
 #include <cmath>
@@ -22,6 +23,24 @@ double extremeOf(const std::string& text)
     return number;
 }
 
+/// Long enough for any number without an exponent.
+using Digits = std::array<char, 400>;
+
+/// The number without what lies after the 15 digits of the scale, which a binary number can't hold.
+double rounded(double number, double scale)
+{
+    constexpr int DigitCount = 15;
+    const int decimals = DigitCount - 1 - static_cast<int>(std::floor(std::log10(scale)));
+    if (!std::isfinite(number) || scale == 0.0 || decimals < 0)
+        return number;
+    Digits digits{};
+    const auto [end, failure] =
+        std::to_chars(digits.data(), digits.data() + digits.size(), number, std::chars_format::fixed, decimals);
+    if (failure == std::errc())
+        std::from_chars(digits.data(), end, number);
+    return number;
+}
+
 } // namespace
 
 void NumberEntry::set(double value)
@@ -33,6 +52,21 @@ void NumberEntry::set(double value)
         m_value = m_minimum;
     // There is no -0.
     m_value += 0.0;
+    m_start = m_value;
+    m_steps = 0.0;
+}
+
+void NumberEntry::step(double count)
+{
+    const double start = m_start;
+    const double steps = m_steps + count;
+    const double way = steps * m_step;
+    const double reached = rounded(start + way, std::max(std::abs(start), std::abs(way)));
+    set(reached);
+    if (m_value == reached) {
+        m_start = start;
+        m_steps = steps;
+    }
 }
 
 void NumberEntry::setRange(double minimum, double maximum, double step)
@@ -56,8 +90,7 @@ void NumberEntry::type(const std::string& text)
 
 std::string NumberEntry::number() const
 {
-    // Long enough for the longest number without an exponent.
-    std::array<char, 400> digits{};
+    Digits digits{};
     const auto [end, failure] =
         std::to_chars(digits.data(), digits.data() + digits.size(), m_value, std::chars_format::fixed);
     return failure == std::errc() ? std::string(digits.data(), end) : std::string();

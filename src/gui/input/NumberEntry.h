@@ -17,8 +17,10 @@ public:
     /// In UTF-8.
     void setSuffix(const std::string& suffix) { m_suffix = suffix; }
 
-    void stepUp() { set(m_value + m_step); }
-    void stepDown() { set(m_value - m_step); }
+    /// As many steps lead to the same number as if they were one, with 15 digits: three steps of 0.1 to 0.3, three of a third
+    /// to 1.
+    void stepUp() { step(1.0); }
+    void stepDown() { step(-1.0); }
     /// Reads a number. A text that is none reads as 0.
     void type(const std::string& text);
 
@@ -27,8 +29,12 @@ public:
     std::string numberWithSuffix() const { return number() + m_suffix; }
 
 private:
+    void step(double count);
+
     std::string m_suffix;
     double m_value = 0.0;
+    double m_start = 0.0; ///< where the steps began
+    double m_steps = 0.0; ///< how many there were
     double m_step = 1.0;
     double m_minimum = 0.0;
     double m_maximum = 100.0;

@@ -33,8 +33,21 @@ std::wstring TextShortening::cut(const std::wstring& text, double boxWidth, cons
     return text.substr(0, fitting) + L"...";
 }
 
-const std::wstring& TextShortening::cutOnce(const std::wstring& text, double boxWidth, const std::wstring& fontKey,
-                                            const Measure& measure)
+std::wstring TextShortening::cutOnce(const std::wstring& text, double boxWidth, const std::wstring& fontKey,
+                                     const Measure& measure)
+{
+    if (text.size() <= LongestRemembered)
+        return rememberedCut(text, boxWidth, fontKey, measure);
+    if (hasSeveralLines(text))
+        return text;
+    // Where the box has no room for a part of the text, what follows the part doesn't matter.
+    const std::wstring beginning = text.substr(0, LongestRemembered);
+    const std::wstring& shown = rememberedCut(beginning, boxWidth, fontKey, measure);
+    return shown != beginning ? shown : cut(text, boxWidth, measure);
+}
+
+const std::wstring& TextShortening::rememberedCut(const std::wstring& text, double boxWidth,
+                                                  const std::wstring& fontKey, const Measure& measure)
 {
     std::tuple key(text, boxWidth, fontKey);
     const auto known = m_cut.find(key);

@@ -21,14 +21,19 @@ public:
     static std::wstring cut(const std::wstring& text, double boxWidth, const Measure& measure);
 
     /// As cut. The font's key names whatever the measure depends on.
-    const std::wstring& cutOnce(const std::wstring& text, double boxWidth, const std::wstring& fontKey,
-                                const Measure& measure);
+    std::wstring cutOnce(const std::wstring& text, double boxWidth, const std::wstring& fontKey,
+                         const Measure& measure);
 
     /// How many texts it remembers at most. When there are more, it forgets them all.
     static constexpr std::size_t Capacity = 4096;
+    /// How many letters of a text it remembers. Wide boxes have room for fewer.
+    static constexpr std::size_t LongestRemembered = 256;
     std::size_t size() const { return m_cut.size(); }
 
 private:
+    const std::wstring& rememberedCut(const std::wstring& text, double boxWidth, const std::wstring& fontKey,
+                                      const Measure& measure);
+
     std::map<std::tuple<std::wstring, double, std::wstring>, std::wstring> m_cut;
 };
 

@@ -27,7 +27,6 @@ std::vector<bool> canHeal(const EventList& list, const EventList& newList, const
                           const std::vector<int>& ids)
 {
     std::vector<bool> can(ids.size());
-    const EventList selection = EventRows::listOf(selected);
     const auto askEach = [&](const core::HealCheck& check) {
         for (std::size_t index = 0; index < ids.size(); ++index) {
             try {
@@ -39,7 +38,7 @@ std::vector<bool> canHeal(const EventList& list, const EventList& newList, const
         }
     };
     try {
-        askEach(core::HealCheck(list, selection, newList));
+        askEach(core::HealCheck(list, selected, newList));
     } catch (util::Result::Type) {
         // Nothing can be healed then.
     }

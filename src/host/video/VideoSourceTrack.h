@@ -4,7 +4,7 @@
 
 #include "core/model/VideoList.h"
 #include "core/time/SecondsRange.h"
-#include "gui/video/VideoTrackHandlerBase.h"
+#include "gui/services/VideoTrackHandlerBase.h"
 #include "host/track/Track.h"
 #include "host/video/VideoWriting.h"
 #include "velmark/Counted.h"

@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "gui/video/VideoTrackHandlerBase.h"
+#include "gui/services/VideoTrackHandlerBase.h"
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
 #include "util/ListenerSet.h"

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/figures/EdlFrames.h"
 #include "tests/app/figures/NotesReplay.h"
@@ -52,6 +53,24 @@ Recut film(const TempFolder& cuts)
         recut.newFiles.push_back(cuts / ("film_v04_r" + number));
     }
     return recut;
+}
+
+/// ONE ends five frames earlier, FOUR begins as much earlier, and FIVE is gone.
+Recut nudged(const TempFolder& cuts)
+{
+    const std::string before = cut("001", "ONE", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00") +
+                               cut("002", "TWO", "10:00:00:00 10:00:03:00", "01:00:10:00 01:00:13:00") +
+                               cut("003", "THREE", "10:00:00:00 10:00:01:00", "01:00:13:00 01:00:14:00") +
+                               cut("004", "FOUR", "10:00:01:00 10:00:11:00", "01:00:14:00 01:00:24:00") +
+                               cut("005", "FIVE", "10:00:00:00 10:00:05:00", "01:00:24:00 01:00:29:00");
+    const std::string after = cut("001", "ONE", "10:00:00:00 10:00:09:19", "01:00:00:00 01:00:09:19") +
+                              cut("002", "TWO", "10:00:00:00 10:00:03:00", "01:00:09:19 01:00:12:19") +
+                              cut("003", "THREE", "10:00:00:00 10:00:01:00", "01:00:12:19 01:00:13:19") +
+                              cut("004", "FOUR", "10:00:00:19 10:00:11:00", "01:00:13:19 01:00:24:00");
+    return {{cuts.write("nudged_v1.edl", before)},
+            {cuts.write("nudged_v2.edl", after)},
+            {"--rate", "24 fps"},
+            {false, std::regex("()().^")}};
 }
 
 class NotesFigures : public testing::Test {
@@ -157,7 +176,7 @@ std::vector<std::vector<std::string>> rowsOf(const NotesReplay& replay)
 std::vector<std::vector<std::string>> rowsInText(const std::string& text)
 {
     static const std::regex Row("^\\s*[0-9]*\\s+[0-9]{2}:[0-9]{2}:[0-9]{2}:[0-9]{2}\\s+"
-                                "(kept|delete|insert|replace|move|new version)[ ,].*");
+                                "(kept|delete|insert|replace|move|moved|new version)[ ,].*");
     std::vector<std::vector<std::string>> rows;
     for (const std::string& line : linesOf(text)) {
         if (std::regex_match(line, Row))
@@ -248,6 +267,7 @@ std::string plain(const std::string& text)
 
 TEST_F(NotesFigures, AreThoseOfTheFramesOfBothCuts)
 {
+    std::size_t movesBetweenReels = 0;
     for (const Recut& recut : all()) {
         const EdlFrames oldCut(recut.oldFiles, recut.rules);
         const EdlFrames newCut(recut.newFiles, recut.rules);
@@ -257,6 +277,26 @@ TEST_F(NotesFigures, AreThoseOfTheFramesOfBothCuts)
 
         EXPECT_EQ(replay.faults(), std::vector<std::string>()) << recut.newFiles.front();
         EXPECT_GT(replay.rows().size(), 80U);
+        movesBetweenReels += replay.movesBetweenReels();
+    }
+    EXPECT_GT(movesBetweenReels, 0U);
+}
+
+TEST_F(NotesFigures, OfJoinedTrimsAreThoseOfTheFrames)
+{
+    // Five frames go before TWO and THREE, and come after them; the two have 96.
+    for (const auto& [simplify, expected] : {std::pair{"95", 0}, std::pair{"96", 1}}) {
+        Recut recut = nudged(cuts);
+        recut.options.insert(recut.options.end(), {"--simplify", simplify});
+        const json notes = notesOf(recut, {"--feet"});
+
+        const NotesReplay replay(notes, EdlFrames(recut.oldFiles, recut.rules), EdlFrames(recut.newFiles, recut.rules));
+
+        EXPECT_EQ(replay.faults(), std::vector<std::string>()) << simplify;
+        EXPECT_EQ(replay.unchanged(), expected);
+        EXPECT_EQ(notes.at("totals").at("steps"), expected == 0 ? 3 : 2);
+        EXPECT_EQ(notes.at("totals").at("liftedFrames"), 5 * 24 + (expected == 0 ? 5 : 101));
+        EXPECT_EQ(notes.at("totals").at("insertedFrames"), expected == 0 ? 5 : 101);
     }
 }
 
@@ -334,6 +374,8 @@ TEST_F(NotesFigures, KeepAllThatTheChangeEdlKeeps)
                     mark(newCut.frameAt(framesOfTimecode(row.at("newIn"))), row.at("frames"));
                     continue;
                 }
+                if (row.at("row") == "moved")
+                    continue;
                 for (const json& entry : row.at("changes")) {
                     if (entry.at("kind") == "doubled")
                         mark(newCut.frameAt(framesOfTimecode(entry.at("new").at("in"))), entry.at("frames"));
@@ -355,7 +397,10 @@ TEST_F(NotesFigures, KeepAllThatTheChangeEdlKeeps)
 
 TEST_F(NotesFigures, AreTheSameInEveryForm)
 {
-    for (const Recut& recut : all()) {
+    std::vector<Recut> recuts = all();
+    recuts.push_back(nudged(cuts));
+    recuts.back().options.insert(recuts.back().options.end(), {"--simplify", "100"});
+    for (const Recut& recut : recuts) {
         const json notes = notesOf(recut);
         const json& totals = notes.at("totals");
         const NotesReplay replay(notes, EdlFrames(recut.oldFiles, recut.rules), EdlFrames(recut.newFiles, recut.rules));
@@ -376,7 +421,8 @@ TEST_F(NotesFigures, AreTheSameInEveryForm)
             replay.largest());
         EXPECT_EQ(numbersIn(matchesIn(between(paper, "The largest changes", end), std::regex("step ([0-9]+):"), 1)),
                   replay.largest());
-        EXPECT_EQ(numbersIn(matchesIn(page, std::regex("\">step ([0-9]+)</a>"), 1)), replay.largest());
+        EXPECT_EQ(numbersIn(matchesIn(page, std::regex("<li><a href=\"#s[0-9]+\">step ([0-9]+)</a>"), 1)),
+                  replay.largest());
 
         EXPECT_TRUE(
             stand({time("framesBefore") + " before, " + time("framesAfter") + " after, " + change,
@@ -411,7 +457,7 @@ TEST_F(NotesFigures, OfTheCsvAreThoseOfTheSteps)
         const json notes = notesOf(recut);
         for (const json& reel : notes.at("reels")) {
             for (const json& row : reel.at("rows")) {
-                if (row.at("row") == "kept")
+                if (row.at("row") != "step")
                     continue;
                 const auto number = [&row](const char* key) { return row.value(key, 0); };
                 const auto time = [&](const char* key) {

@@ -411,6 +411,8 @@ TEST(EventListCanHeal, NeighboursAreFoundByTheEventWhereTwoStartTogether)
     EXPECT_TRUE(list.canHeal(listOf({b, c}), NoReference, HealMode::Normal));
     EXPECT_FALSE(list.canHeal(listOf({a, c}), NoReference, HealMode::Normal));
     EXPECT_TRUE(list.canHeal(listOf({a, b, c}), NoReference, HealMode::Normal));
+    // In whatever order they were selected.
+    EXPECT_TRUE(list.canHeal(listOf({c, b, a}), NoReference, HealMode::Normal));
 }
 
 TEST(EventListCanHeal, ChangesNothingAndSendsNothing)

@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/HealedEvent.h"
+#include "core/edl/ProgrammeOrder.h"
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
 #include "tests/support/ThrownResult.h"
@@ -63,6 +64,11 @@ Settings settingsFor(std::int32_t healMode, std::int32_t matchBy = MatchBy::Roll
     return settings;
 }
 
+std::vector<core::PlacedEvent> orderOf(const EventList& list)
+{
+    return core::inProgrammeOrder(list.events(), Timecode::framerate());
+}
+
 /// Heals the list and checks what the count of it was.
 void heal(EventList& list, std::int32_t healMode, const Events& reference = {},
           std::int32_t matchBy = MatchBy::RollName)
@@ -70,7 +76,7 @@ void heal(EventList& list, std::int32_t healMode, const Events& reference = {},
     const EventList referenceList = listOf(reference);
     const Settings settings = settingsFor(healMode, matchBy);
     const HealContext context{&referenceList, &settings, Timecode::framerate()};
-    const std::size_t expected = HealProcessing().countAfter(list, context);
+    const std::size_t expected = HealProcessing().countAfter(orderOf(list), context);
     HealProcessing().process(list, context);
     EXPECT_EQ(list.size(), expected);
 }
@@ -352,7 +358,8 @@ TEST(HealProcessing, CountingChangesNothing)
     const EventList reference;
     const Settings settings = settingsFor(HealMode::Normal);
 
-    const std::size_t count = HealProcessing().countAfter(list, {&reference, &settings, Timecode::framerate()});
+    const std::size_t count =
+        HealProcessing().countAfter(orderOf(list), {&reference, &settings, Timecode::framerate()});
 
     EXPECT_EQ(count, 1u);
     EXPECT_EQ(list.events(), (Events{second, first}));

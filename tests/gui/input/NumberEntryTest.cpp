@@ -180,6 +180,73 @@ TEST(NumberEntry, ShowsTheLargestAndTheSmallestNumber)
     EXPECT_FALSE(entry.number().empty());
 }
 
+TEST(NumberEntry, ShowsTheDecimalsOfItsSteps)
+{
+    NumberEntry entry;
+    entry.setRange(-1.0, 1.0, 0.1);
+
+    for (const char* const expected : {"0.1", "0.2", "0.3", "0.4", "0.5", "0.6", "0.7", "0.8", "0.9", "1", "1"}) {
+        entry.stepUp();
+        EXPECT_EQ(entry.number(), expected);
+    }
+    for (const char* const expected : {"0.9", "0.8", "0.7", "0.6", "0.5", "0.4", "0.3", "0.2", "0.1", "0", "-0.1"}) {
+        entry.stepDown();
+        EXPECT_EQ(entry.number(), expected);
+    }
+}
+
+TEST(NumberEntry, StepsOnFromWhatWasTyped)
+{
+    NumberEntry entry;
+    entry.setRange(0.0, 10.0, 0.1);
+    entry.stepUp();
+
+    entry.type("0.35");
+    entry.stepUp();
+    EXPECT_EQ(entry.number(), "0.45");
+    entry.stepDown();
+    entry.stepDown();
+    EXPECT_EQ(entry.number(), "0.25");
+}
+
+TEST(NumberEntry, ReachesAWholeNumberInStepsOfAThird)
+{
+    NumberEntry entry;
+    entry.setRange(0.0, 10.0, 1.0 / 3.0);
+
+    entry.stepUp();
+    EXPECT_EQ(entry.number(), "0.333333333333333");
+    entry.stepUp();
+    EXPECT_EQ(entry.number(), "0.666666666666667");
+    entry.stepUp();
+    EXPECT_EQ(entry.number(), "1");
+}
+
+TEST(NumberEntry, StepsByWhateverANumberHolds)
+{
+    NumberEntry entry;
+    entry.setRange(0.0, std::numeric_limits<double>::max(), 1e-300);
+    entry.stepUp();
+    entry.stepUp();
+    entry.stepUp();
+    EXPECT_EQ(entry.value(), 3e-300);
+
+    entry.setRange(0.0, std::numeric_limits<double>::max(), 1e300);
+    entry.stepUp();
+    EXPECT_EQ(entry.value(), 1e300);
+    entry.setRange(0.0, std::numeric_limits<double>::max(), std::numeric_limits<double>::max());
+    entry.stepUp();
+    EXPECT_EQ(entry.value(), std::numeric_limits<double>::max());
+
+    entry.setRange(0.0, 5.0, 0.0);
+    entry.set(2.0);
+    entry.stepUp();
+    EXPECT_EQ(entry.number(), "2");
+    entry.set(0.0);
+    entry.stepUp();
+    EXPECT_EQ(entry.number(), "0");
+}
+
 RC_GTEST_PROP(NumberEntryLaws, TypingWhatIsShownChangesNothing, ())
 {
     NumberEntry entry;
@@ -190,4 +257,20 @@ RC_GTEST_PROP(NumberEntryLaws, TypingWhatIsShownChangesNothing, ())
     entry.type(entry.number());
 
     RC_ASSERT(entry.value() == before);
+}
+
+RC_GTEST_PROP(NumberEntryLaws, ManyStepsOfADecimalShowNoMoreDecimalsThanItHas, ())
+{
+    const int thousandths = *rc::gen::inRange(1, 5000);
+    const int count = *rc::gen::inRange(1, 300);
+    NumberEntry entry;
+    entry.setRange(0.0, 10000000.0, thousandths / 1000.0);
+
+    for (int step = 0; step < count; ++step)
+        entry.stepUp();
+    RC_ASSERT(entry.value() == thousandths * count / 1000.0);
+
+    for (int step = 0; step < count; ++step)
+        entry.stepDown();
+    RC_ASSERT(entry.number() == "0");
 }

@@ -132,3 +132,53 @@ TEST(TextShortening, RemembersABoundedNumberOfTexts)
     EXPECT_EQ(shortening.size(), 1U);
     EXPECT_EQ(shortening.cutOnce(L"7", 100.0, L"plain", width), L"7");
 }
+
+TEST(TextShortening, RemembersNoMoreOfALongTextThanItsBeginning)
+{
+    TextShortening shortening;
+    std::size_t longest = 0;
+    const auto noting = [&longest](const std::wstring& text) {
+        longest = std::max(longest, text.size());
+        return width(text);
+    };
+    const std::wstring beginning(TextShortening::LongestRemembered, L'x');
+
+    EXPECT_EQ(shortening.cutOnce(beginning + L'y', 40.0, L"plain", noting), L"xxxxx...");
+    EXPECT_EQ(shortening.cutOnce(beginning + std::wstring(100000, L'z'), 40.0, L"plain", noting), L"xxxxx...");
+
+    EXPECT_EQ(longest, beginning.size());
+    EXPECT_EQ(shortening.size(), 1U);
+}
+
+TEST(TextShortening, ShowsALongTextWholeWhereTheBoxHasRoomForIt)
+{
+    TextShortening shortening;
+    const std::wstring text(TextShortening::LongestRemembered + 10, L'x');
+    const std::wstring more = text + L'y';
+    const double boxWidth = width(text);
+
+    EXPECT_EQ(shortening.cutOnce(text, boxWidth, L"plain", width), text);
+    EXPECT_EQ(shortening.cutOnce(more, boxWidth, L"plain", width), TextShortening::cut(more, boxWidth, width));
+    EXPECT_EQ(shortening.size(), 1U);
+}
+
+TEST(TextShortening, LeavesALongTextOfSeveralLinesAsItIs)
+{
+    TextShortening shortening;
+    const std::wstring text = std::wstring(TextShortening::LongestRemembered, L'x') + L"\ny";
+
+    EXPECT_EQ(shortening.cutOnce(text, 40.0, L"plain", width), text);
+}
+
+RC_GTEST_PROP(TextShorteningLaws, CutsARememberedTextAsAnyOther, ())
+{
+    TextShortening shortening;
+    const auto length =
+        *rc::gen::inRange<std::size_t>(TextShortening::LongestRemembered - 3, TextShortening::LongestRemembered + 4);
+    const std::wstring text(length, *rc::gen::elementOf(std::wstring(L"ab1")));
+    const auto boxWidth = width(text) + *rc::gen::inRange(-40, 20);
+
+    const std::wstring expected = TextShortening::cut(text, boxWidth, width);
+    RC_ASSERT(shortening.cutOnce(text, boxWidth, L"plain", width) == expected);
+    RC_ASSERT(shortening.cutOnce(text, boxWidth, L"plain", width) == expected);
+}

@@ -22,7 +22,7 @@ namespace {
 
 constexpr int EventCount = 100000;
 /// The limit in seconds of what asks for each of them in the other lists.
-constexpr double ManyAtOnce = 0.8;
+constexpr double ManyAtOnce = 0.25;
 
 /// A list that no one has by hand: 100,000 events of a few frames.
 class EventTableSpeedTest : public cadrel::tests::ShownTable {
@@ -112,13 +112,10 @@ TEST_F(EventTableSpeedTest, EachStepOfAHundredThousandRowsIsDoneInATenthOfASecon
         m_model->selectRows(RowSet::parse("5000", EventCount));
         m_model->openMenu();
     });
-    expectFast(
-        "open the menu of all",
-        [&] {
-            m_model->selectAll();
-            m_model->openMenu();
-        },
-        ManyAtOnce);
+    expectFast("open the menu of all", [&] {
+        m_model->selectAll();
+        m_model->openMenu();
+    });
     m_choose = nullptr;
     expectFast("store the selection",
                [&] { cadrel::gui::StoredTable(m_dataModel, 2).setSelection(m_model->getSelectedRows()); });
