@@ -60,21 +60,17 @@ std::vector<std::string> filesOf(const std::string& path, std::size_t eventCount
 {
     if (path.empty())
         return {};
-    if (eventCount <= CmxWriter::MostEventsInAFile)
-        return {path};
     std::vector<std::string> files;
-    for (std::size_t first = 0; first < eventCount; first += CmxWriter::MostEventsInAFile)
-        files.push_back(StringUtil::toUtf8(StringUtil::withIndex(toWide(path), static_cast<int>(files.size()) + 1)));
+    for (const std::wstring& file : CmxWriter::filesOf(toWide(path), eventCount))
+        files.push_back(StringUtil::toUtf8(file));
     return files;
 }
 
 void saveChangeEdl(const EventList& changeEvents, const std::string& path, const std::vector<std::string>& files,
                    bool mayReplace)
 {
-    using Mode = CmxWriter::FrameCountMode;
     using Existing = CmxWriter::Existing;
-    CmxWriter writer(Timecode::framerate().dropFrame == 1 ? Mode::DropFrame : Mode::Unsaid,
-                     mayReplace ? Existing::Replaced : Existing::Kept);
+    CmxWriter writer(CmxWriter::modeFor(Timecode::framerate()), mayReplace ? Existing::Replaced : Existing::Kept);
     const Result::Type result = writer.write(toWide(path), changeEvents);
     if (result == Result::Refused) {
         const auto there =

@@ -25,8 +25,8 @@ const std::set<std::string> NotTranslated = {
 };
 
 /// What a German sound editor calls so too.
-const std::set<std::string> SameInGerman = {"Cadrel",  "OK",     "EDLs",    "IN",     "OUT",  "SRC IN",
-                                            "SRC OUT", "DST IN", "DST OUT", "Normal", "Video"};
+const std::set<std::string> SameInGerman = {"Cadrel",  "OK",     "EDLs",    "IN",     "OUT",   "SRC IN",
+                                            "SRC OUT", "DST IN", "DST OUT", "Normal", "Video", "Name"};
 
 /// The wide texts of the sources that hold a letter: all that the user reads in the host goes out in this form.
 std::set<std::string> textsOfTheSources()

@@ -4,6 +4,7 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
+#include "core/time/Framerate.h"
 #include "util/FilePath.h"
 #include "util/FileReplacement.h"
 #include "util/FileStamp.h"
@@ -152,6 +153,21 @@ try {
     return Result::Refused;
 } catch (Result::Type failure) {
     return failure;
+}
+
+std::vector<std::wstring> CmxWriter::filesOf(const std::wstring& path, std::size_t eventCount)
+{
+    if (eventCount <= MostEventsInAFile)
+        return {path};
+    std::vector<std::wstring> files;
+    for (std::size_t first = 0; first < eventCount; first += MostEventsInAFile)
+        files.push_back(StringUtil::withIndex(path, static_cast<int>(files.size()) + 1));
+    return files;
+}
+
+CmxWriter::FrameCountMode CmxWriter::modeFor(const Framerate& framerate)
+{
+    return framerate.dropFrame == 1 ? FrameCountMode::DropFrame : FrameCountMode::Unsaid;
 }
 
 std::string CmxWriter::normalizedRollName(const std::string& name)

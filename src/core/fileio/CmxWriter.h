@@ -6,6 +6,11 @@
 
 #include <cstddef>
 #include <string>
+#include <vector>
+
+namespace cadrel::core {
+struct Framerate;
+} // namespace cadrel::core
 
 namespace cadrel::core::fileio {
 
@@ -39,6 +44,11 @@ public:
     /// can't be opened or written, NotAvailable when it could be but has an empty last component, Refused where a file is to
     /// be kept, or what is thrown while writing.
     util::Result::Type write(const std::wstring& path, const EventList& events) override;
+
+    /// The files into which a list of that many events goes.
+    static std::vector<std::wstring> filesOf(const std::wstring& path, std::size_t eventCount);
+    /// What a list of that rate says, so that it is read as it was.
+    static FrameCountMode modeFor(const Framerate& framerate);
 
     /// A roll name as the file's eight columns take it: capitals, digits and ".-_", and "SHOT_-12" for
     /// "SHOT_LONGNAME_12".

@@ -71,6 +71,12 @@ std::wstring Guard::messageOfFailure()
     }
 }
 
+void Guard::tell(const std::wstring& text)
+{
+    if (frames > 0 && droppingFrames == 0 && message.empty())
+        message = text;
+}
+
 Guard::Frame::Frame(Cause cause) : m_cause(cause)
 {
     ++frames;

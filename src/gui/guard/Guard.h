@@ -33,6 +33,10 @@ public:
         }
     }
 
+    /// Tells the user something after the outermost frame, unless a failure or another message is to be told then. Within a
+    /// frame that drops failures, and for an empty text, it does nothing. The text is in the user's language.
+    static void tell(const std::wstring& text);
+
     /// What the user reads after the exception that is being handled; empty where that is nothing. Result::Cancelled and
     /// Result::NoProject tell nothing.
     static std::wstring messageOfFailure();

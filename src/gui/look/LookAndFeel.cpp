@@ -75,6 +75,8 @@ void LookAndFeel::setColours()
     setColour(juce::PopupMenu::backgroundColourId, juce::Colour(240, 240, 240));
     setColour(juce::PopupMenu::highlightedBackgroundColourId, toColour(Palette::lightBlue).withAlpha(0.4F));
     setColour(juce::PopupMenu::highlightedTextColourId, black);
+    setColour(juce::ToggleButton::tickDisabledColourId, black); // the box
+    setColour(juce::ToggleButton::tickColourId, toColour(Palette::sheet));
     setColour(juce::TextButton::buttonOnColourId, toColour(Palette::lightBlue));
 }
 

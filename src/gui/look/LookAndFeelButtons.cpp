@@ -98,7 +98,7 @@ void LookAndFeel::drawTickBox(juce::Graphics& graphics, juce::Component& compone
     guardSystem([&] {
         const float opacity = isEnabled ? 1.0F : DisabledOpacity;
         const juce::Rectangle<float> box(x, y + 2.0F, width - 4.0F, height - 4.0F);
-        graphics.setColour(juce::Colours::black.withAlpha(opacity));
+        graphics.setColour(component.findColour(juce::ToggleButton::tickDisabledColourId).withMultipliedAlpha(opacity));
         graphics.fillRect(box);
         if (component.hasKeyboardFocus(false))
             drawFocusRing(graphics, box.expanded(2.0F), 1.0F);
@@ -108,7 +108,7 @@ void LookAndFeel::drawTickBox(juce::Graphics& graphics, juce::Component& compone
         tick.startNewSubPath(x + 0.15F * width, y + 0.5F * height);
         tick.lineTo(x + 0.35F * width, y + 0.7F * height);
         tick.lineTo(x + 0.55F * width, y + 0.3F * height);
-        graphics.setColour(toColour(Palette::sheet).withMultipliedAlpha(opacity));
+        graphics.setColour(component.findColour(juce::ToggleButton::tickColourId).withMultipliedAlpha(opacity));
         graphics.strokePath(tick, juce::PathStrokeType(2.7F));
     });
 }

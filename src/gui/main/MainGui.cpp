@@ -1,28 +1,58 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+// What happens in the window: buttons, keys, what the tables tell.
+
 #include "gui/main/MainGui.h"
 
+#include "core/conform/CadrelerBase.h"
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextNotificationBase.h"
+#include "gui/guard/Guard.h"
+#include "gui/look/ShownText.h"
+#include "gui/picture/VideoProviderBase.h"
+#include "util/Result.h"
 
 namespace cadrel::gui {
 
+using core::ListKind;
+using util::Result;
+
 namespace {
 
-const juce::Colour Background(0xff2b2c2d);
+constexpr int TooltipDelay = 700;
+const juce::Colour Background(0xff070c10);
 
 } // namespace
 
 MainGui::MainGui()
+    : m_saveFolder(juce::File::getSpecialLocation(juce::File::userHomeDirectory).getFullPathName().toWideCharPointer()),
+      m_controls(
+          [this](std::int32_t listKind, const std::vector<std::string>& paths) { takeDroppedFiles(listKind, paths); }),
+      m_tooltips(this, TooltipDelay)
 {
     setOpaque(true);
     setWantsKeyboardFocus(true);
+    addAndMakeVisible(m_controls);
+    for (Sheet* const sheet : std::initializer_list<Sheet*>{&m_videosDialog, &m_fileDialog, &m_editDialog}) {
+        sheet->setBeneath(&m_controls);
+        addChildComponent(sheet);
+    }
+    m_fileDialog.addComponentListener(this);
+    for (std::size_t index = 0; index < MainButtonCount; ++index)
+        m_controls.button(static_cast<MainButton>(index)).addListener(this);
+    setSize(Width, Height);
+    setModel(nullptr);
 }
 
 MainGui::~MainGui()
 {
+    guardSystem([this] { stopPreview(); });
     if (m_notifier)
         m_notifier->removeListener(this);
+    m_fileDialog.removeComponentListener(this);
+    guardSystem([this] { letGoOfModel(); });
 }
 
 void MainGui::setNotifier(core::ChangeContextNotificationBase* notifier)
@@ -36,17 +66,151 @@ void MainGui::setNotifier(core::ChangeContextNotificationBase* notifier)
         onChange(core::DataModelChangeContext(nullptr));
 }
 
+void MainGui::setVideoSource(const std::shared_ptr<VideoProviderBase>& provider)
+{
+    guardSystem([&] { m_controls.video().setProvider(provider); });
+    m_videosDialog.setTrackHandler(provider ? &provider->getTrackHandler() : nullptr);
+}
+
 void MainGui::onChange(const core::ChangeContext& context)
 {
-    if (context.type != core::ChangeContext::DataModelChanged)
-        return;
-    m_model = static_cast<const core::DataModelChangeContext&>(context).dataModel;
-    repaint();
+    // How a run or a preview ends is told to the user, who has asked for it.
+    if (context.type == core::ChangeContext::ActionFinished)
+        guardUser([&] { handle(context); });
+    else
+        guardSystem([&] { handle(context); });
 }
 
 void MainGui::paint(juce::Graphics& graphics)
 {
-    graphics.fillAll(Background);
+    guardSystem([&] { graphics.fillAll(Background); });
+}
+
+void MainGui::resized()
+{
+    guardSystem([this] {
+        m_controls.setBounds(getLocalBounds());
+        m_videosDialog.setBounds(getLocalBounds());
+        m_fileDialog.setBounds(getLocalBounds());
+    });
+}
+
+void MainGui::focusGained(FocusChangeType)
+{
+    guardSystem([this] {
+        if (isEnabled() && m_controls.isEnabled())
+            m_controls.panel(ListKind::Change).table().grabKeyboardFocus();
+    });
+}
+
+bool MainGui::keyPressed(const juce::KeyPress& key)
+{
+    const bool isLeft = key == juce::KeyPress(juce::KeyPress::leftKey);
+    const bool isRight = key == juce::KeyPress(juce::KeyPress::rightKey);
+    if ((!isLeft && !isRight) || !isEnabled() || !m_controls.isEnabled())
+        return false;
+    guardUser([&] {
+        m_controls.button(isLeft ? MainButton::In : MainButton::Out).setToggleState(true, juce::sendNotification);
+    });
+    return true;
+}
+
+void MainGui::buttonClicked(juce::Button* button)
+{
+    guardUser([&] {
+        if (m_model)
+            carryOut(m_controls.which(*button));
+    });
+}
+
+void MainGui::carryOut(MainButton button)
+{
+    switch (button) {
+    case MainButton::AddOld:
+        return addFiles(ListKind::Old);
+    case MainButton::AddNew:
+        return addFiles(ListKind::New);
+    case MainButton::AddChange:
+        return addFiles(ListKind::Change);
+    case MainButton::Generate:
+        return generate();
+    case MainButton::ClearOld:
+        return clear(ListKind::Old);
+    case MainButton::ClearNew:
+        return clear(ListKind::New);
+    case MainButton::ClearChange:
+        return clear(ListKind::Change);
+    case MainButton::Save:
+        return save();
+    case MainButton::Start:
+        return start();
+    case MainButton::Preview:
+        return switchPreview(m_controls.isOn(button));
+    // Of two buttons that switch each other, both tell of a click.
+    case MainButton::Source:
+    case MainButton::Destination:
+        return m_controls.isOn(button) ? cycleToSelection() : void();
+    case MainButton::In:
+    case MainButton::Out:
+        return m_controls.isOn(button) ? showVideo() : void();
+    case MainButton::Videos:
+        return m_videosDialog.setVisible(true);
+    case MainButton::Settings:
+        break;
+    }
+}
+
+void MainGui::componentVisibilityChanged(juce::Component& component)
+{
+    if (component.isVisible() || m_isModelChanging)
+        return;
+    // A change of the VFX names, or a list that has come, counts at once.
+    guardUser([this] {
+        if (!m_model)
+            return;
+        try {
+            m_model->applyVfxHandling();
+        } catch (Result::Type failure) {
+            if (failure != Result::InvalidArgument)
+                throw;
+            Guard::tell(translated(L"A VFX name of the settings can't be used. Correct it there."));
+        }
+    });
+}
+
+void MainGui::selectionChanged(EventTableModel& model)
+{
+    ListPanel* const panel = m_controls.panelOf(model);
+    if (!panel || !m_model)
+        return;
+    m_controls.forEachPanel([](ListPanel& each) { each.updateCounters(); });
+    panel->storeSelection();
+    if (panel->listKind() != ListKind::Change)
+        return;
+    showPreview();
+    showSelection();
+}
+
+void MainGui::sortChanged(EventTableModel& model)
+{
+    if (ListPanel* const panel = m_controls.panelOf(model)) {
+        panel->storeSortKey();
+        panel->storeSelection();
+    }
+}
+
+void MainGui::editRequested(const std::shared_ptr<core::EventBase>& event, EventTableModel& model,
+                            juce::Point<int> position)
+{
+    const ListPanel* const panel = m_controls.panelOf(model);
+    if (!panel)
+        return;
+    const juce::Point<int> mouse = getLocalPoint(nullptr, position);
+    m_editDialog.setSingleSelectionMode(panel->listKind() != ListKind::Change);
+    m_editDialog.setEvent(event, panel->listKind());
+    m_editDialog.setTopLeftPosition(MainLayout::besideMouse(mouse.x, m_editDialog.getWidth(), getWidth()),
+                                    MainLayout::besideMouse(mouse.y, m_editDialog.getHeight(), getHeight()));
+    m_editDialog.setVisible(true);
 }
 
 } // namespace cadrel::gui

@@ -3,11 +3,23 @@
 #pragma once
 
 #include "core/notify/ChangeContextListenerInterface.h"
+#include "gui/edit/TcEditDialog.h"
+#include "gui/files/FileDialog.h"
 #include "gui/look/LookAndFeel.h"
+#include "gui/main/MainControls.h"
+#include "gui/table/EventTableModel.h"
+#include "gui/video/NewVideosDialog.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
 namespace cadrel::core {
+class ActionChangeContext;
 class CadrelerBase;
 class ChangeContextNotificationBase;
 class DataModel;
@@ -17,30 +29,107 @@ namespace cadrel::gui {
 
 class VideoProviderBase;
 
-/// The window of Cadrel. It shows the model that its notifier names, and asks the engine for what is to be done.
-class MainGui : public juce::Component, public core::ChangeContextListenerInterface {
+/// The window of Cadrel. It shows the model that its notifier names, asks the engine for what is to be done, and draws itself
+/// anew when it is told of a change:
+///
+///     a button, a key  >  model or engine  >  notifier  >  onChange  >  tables, counters, timeline, pictures
+///
+/// What it decides is in the plain classes beside it. All controls are in one child, over which the dialogs lie.
+class MainGui : public juce::Component,
+                public core::ChangeContextListenerInterface,
+                private juce::ComponentListener,
+                private EventTableModel::Listener,
+                private juce::Button::Listener {
 public:
+    static constexpr int Width = 1300;
+    static constexpr int Height = 750;
+
     MainGui();
+    /// Ends a preview that is on.
     ~MainGui() override;
 
-    /// None of these is owned; each outlives the window or is taken away with null.
+    /// Engine and notifier aren't owned; each outlives the window or is taken away with null.
     void setEngine(core::CadrelerBase* engine) { m_engine = engine; }
     /// Without a notifier there is no model either.
     void setNotifier(core::ChangeContextNotificationBase* notifier);
-    void setVideoSource(VideoProviderBase* provider) { m_video = provider; }
+    /// Where the pictures of the video preview come from; null for nowhere.
+    void setVideoSource(const std::shared_ptr<VideoProviderBase>& provider);
 
     /// Null when no project is active.
     core::DataModel* model() const { return m_model; }
 
     void onChange(const core::ChangeContext& context) override;
     void paint(juce::Graphics& graphics) override;
+    void resized() override;
+    bool keyPressed(const juce::KeyPress& key) override;
+    void focusGained(FocusChangeType cause) override;
 
 private:
+    // What happens; in MainGui.cpp.
+
+    void buttonClicked(juce::Button* button) override;
+    void componentVisibilityChanged(juce::Component& component) override;
+    void selectionChanged(EventTableModel& model) override;
+    void sortChanged(EventTableModel& model) override;
+    void editRequested(const std::shared_ptr<core::EventBase>& event, EventTableModel& model,
+                       juce::Point<int> position) override;
+    void carryOut(MainButton button);
+
+    // What is shown; in MainGuiChanges.cpp.
+
+    void handle(const core::ChangeContext& context);
+    void setModel(core::DataModel* model);
+    void letGoOfModel();
+    void showModel();
+    void showList(std::int32_t listKind);
+    void listReplaced(std::int32_t listKind);
+    /// Which events of the cuts the selected ones come from, in the tables, on the timeline and in the pictures.
+    void showSelection();
+    void showVideo();
+    /// What the dialog of the videos works on.
+    void showVideoList();
+    /// Puts the preview button and those beside it into the state of the model.
+    void showPreviewState();
+    /// Which buttons can be used, and what to do first.
+    void showCommands();
+    void actionEnded(const core::ActionChangeContext& end);
+    void focusChangeTable();
+
+    // What the user asks for; in MainGuiCommands.cpp.
+
+    void addFiles(std::int32_t listKind);
+    void takeDroppedFiles(std::int32_t listKind, const std::vector<std::string>& paths);
+    void generate();
+    void clear(std::int32_t listKind);
+    void save();
+    void start();
+    void switchPreview(bool isOn);
+    /// False when the model is another one now.
+    bool stopPreview();
+    void showPreview();
+    void cycleToSelection();
+    /// What the engine answers of a preview; the user is told of it once until the preview is switched on again.
+    void tellOfPreview(const std::function<std::wstring()>& request);
+    std::uint32_t previewOptions() const { return m_controls.isOn(MainButton::Destination) ? 1 : 0; }
+
+    EventTableModel* changeTable() { return m_controls.panel(core::ListKind::Change).model(); }
+    EventTableModel::Events selectedChanges();
+    void updateEnablement();
+
     juce::SharedResourcePointer<LookAndFeel> m_look; ///< all windows share it
     core::CadrelerBase* m_engine = nullptr;
     core::ChangeContextNotificationBase* m_notifier = nullptr;
-    VideoProviderBase* m_video = nullptr;
     core::DataModel* m_model = nullptr;
+    bool m_isRunRequested = false; ///< until it has ended or was dropped
+    bool m_hadFocus = false;       ///< when the run was requested
+    bool m_isPreviewTold = false;  ///< the user knows why the preview that is on shows nothing
+    bool m_isModelChanging = false;
+    std::wstring m_saveFolder;
+    MainControls m_controls;
+    NewVideosDialog m_videosDialog;
+    FileDialog m_fileDialog;
+    TcEditDialog m_editDialog;
+    juce::TooltipWindow m_tooltips;
 };
 
 } // namespace cadrel::gui

@@ -198,7 +198,7 @@ int32 Cadrel::createView(const char* name, FUnknown* /*parent*/, IPlugView** vie
         auto content = std::make_unique<gui::MainGui>();
         content->setEngine(m_host.get());
         content->setNotifier(m_host.get());
-        content->setVideoSource(m_video.get());
+        content->setVideoSource(m_video);
         content->onChange(core::DataModelChangeContext(m_host->getProjectModel()));
         m_view = makeCounted<JuceGuiAdapter>(std::move(content), m_context.get(), Counted<FObject>(m_host));
         *view = Counted<JuceGuiAdapter>(m_view).detach();

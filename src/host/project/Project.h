@@ -187,8 +187,8 @@ public:
     /// out all, and throws the first failure at the end.
     void rememberWritten();
     /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
-    /// since stays, and so does what he has moved, renamed, slipped or given another length; a copy that he has changed in no
-    /// other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
+    /// since stays, and so does what he has moved, renamed, slipped or given another length, clip or content; a copy that he
+    /// has changed in no other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
     /// written.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
@@ -256,12 +256,11 @@ private:
     /// All that a run may change but these.
     std::vector<Track> tracksOfTheUser();
     /// What of a track's events in a stretch the system hasn't written, in seconds from the time origin.
-    std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
-                                                                     const core::SecondsRange& stretch);
-    /// Leaves out the copies that stand in a stretch of the preview: what the user has made of them is in their memos, which
-    /// stand before `start`, in seconds from the time origin. One that he has taken out of all stretches is his own.
-    void leaveOutFollowed(std::vector<Velmark::Counted<Velmark::IProjectNode>>& copies, const Track& memos,
-                          double start);
+    static std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
+                                                                            const core::SecondsRange& stretch);
+    /// Removes the copies that their memos have followed, wherever they stand: what the user has made of them is in their
+    /// memos, which stand before `start`, in seconds from the time origin. All others that he has edited are his own.
+    void removeFollowed(Velmark::IEditTransaction& transaction, double start);
     /// Removes the automation points in a stretch, in seconds from the time origin, where none follow. Emptying the stretch
     /// would leave one at its start, as the values of the system's own points are rounded. Where others follow, the curve
     /// needs it to go on before the stretch as it did.

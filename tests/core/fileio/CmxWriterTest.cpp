@@ -541,6 +541,25 @@ RC_GTEST_PROP(CmxWriterLaw, EachFileOfASplitListReadsBackWithTheSameTimecodes, (
     }
 }
 
+TEST(CmxWriter, NamesTheFilesOfAListBeforeItWritesThem)
+{
+    using Paths = std::vector<std::wstring>;
+
+    EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 0), Paths{L"/a/reel.edl"});
+    EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 999), Paths{L"/a/reel.edl"});
+    EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 1000), (Paths{L"/a/reel_1.edl", L"/a/reel_2.edl"}));
+    EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 1998), (Paths{L"/a/reel_1.edl", L"/a/reel_2.edl"}));
+    EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 1999),
+              (Paths{L"/a/reel_1.edl", L"/a/reel_2.edl", L"/a/reel_3.edl"}));
+}
+
+TEST(CmxWriter, SaysTheFrameCountModeOfDropFrameAlone)
+{
+    EXPECT_EQ(CmxWriter::modeFor(Framerate(30, true, 1)), CmxWriter::FrameCountMode::DropFrame);
+    EXPECT_EQ(CmxWriter::modeFor(Framerate(30, true, 0)), CmxWriter::FrameCountMode::Unsaid);
+    EXPECT_EQ(CmxWriter::modeFor(Framerate(25, 0)), CmxWriter::FrameCountMode::Unsaid);
+}
+
 RC_GTEST_PROP(CmxWriterLaw, ARollNameIsAlwaysReadable, (const std::string& name))
 {
     const std::string normalized = CmxWriter::normalizedRollName(name);

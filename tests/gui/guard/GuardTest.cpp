@@ -12,6 +12,7 @@
 #include <string>
 #include <vector>
 
+using cadrel::gui::Guard;
 using cadrel::gui::guardSystem;
 using cadrel::gui::guardUser;
 using cadrel::tests::RecordingAlerts;
@@ -144,6 +145,43 @@ TEST(Guard, ShowsWhatFailsWhileAnAlertIsOpenByAnAlertOfItsOwn)
     guardUser([] { fail(Result::PositionOccupied); });
 
     EXPECT_EQ(alerts.messages.size(), 2U);
+}
+
+TEST(Guard, TellsWhatIsToBeToldAfterTheOutermostFrame)
+{
+    const RecordingAlerts alerts;
+
+    guardUser([&] {
+        guardUser([] { Guard::tell(L"first"); });
+        EXPECT_TRUE(alerts.messages.empty());
+        Guard::tell(L"second");
+    });
+
+    EXPECT_EQ(alerts.messages, std::vector<std::wstring>{L"first"});
+}
+
+TEST(Guard, TellsNothingOutsideOfWhatTheUserDoes)
+{
+    const RecordingAlerts alerts;
+
+    Guard::tell(L"nobody's");
+    guardSystem([] { Guard::tell(L"the system's"); });
+    guardUser([] { Guard::tell(L""); });
+    guardUser([] {});
+
+    EXPECT_TRUE(alerts.messages.empty());
+}
+
+TEST(Guard, TellsTheFirstOfAFailureAndAMessage)
+{
+    const RecordingAlerts alerts;
+
+    guardUser([] {
+        guardUser([] { fail(Result::PositionOccupied); });
+        Guard::tell(L"later");
+    });
+
+    EXPECT_EQ(alerts.messages, std::vector<std::wstring>{L"Another video starts at this timecode."});
 }
 
 TEST(Guard, SurvivesAnAlertThatFails)

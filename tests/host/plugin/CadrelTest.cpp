@@ -3,10 +3,14 @@
 #include "host/plugin/Cadrel.h"
 
 #include "gui/main/MainGui.h"
+#include "gui/picture/VideoProviderBase.h"
+#include "host/Host.h"
+#include "host/video/ProjectVideo.h"
 #include "standin/Application.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/module/ModuleLoader.h"
 #include "standin/project/Project.h"
+#include "standin/services/IdleManager.h"
 #include "standin/services/MenuRegistry.h"
 #include "standin/services/Translations.h"
 #include "standin/services/WindowFactoryRegistry.h"
@@ -27,12 +31,14 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <memory>
 #include <stdexcept>
 #include <string>
 #include <utility>
 #include <vector>
 
 using namespace Velmark;
+using cadrel::gui::VideoProviderBase;
 using cadrel::host::Cadrel;
 using cadrel::host::tests::AlteredContext;
 using cadrel::tests::isMapped;
@@ -132,6 +138,28 @@ public:
     bool throws = false;
     bool throwsAtOpen = false;
     bool failsAfterTheView = false;
+};
+
+/// What a window asks for pictures.
+std::shared_ptr<VideoProviderBase> picturesOf(standin::Application& application)
+{
+    for (IIdleHandler* const handler : application.idleManager().handlers()) {
+        if (auto* const host = dynamic_cast<cadrel::host::Host*>(handler))
+            return std::dynamic_pointer_cast<VideoProviderBase>(host->getVideoProvider());
+    }
+    return nullptr;
+}
+
+/// Looks at the pictures while it lives.
+class PictureWatch : public VideoProviderBase::Listener {
+public:
+    explicit PictureWatch(VideoProviderBase& pictures) : m_pictures(pictures) { m_pictures.addListener(this); }
+    ~PictureWatch() override { m_pictures.removeListener(this); }
+
+    void imageChanged(std::size_t) override {}
+
+private:
+    VideoProviderBase& m_pictures;
 };
 
 class CadrelTest : public testing::Test, protected cadrel::tests::HostLoop {
@@ -423,6 +451,36 @@ TEST_F(CadrelTest, TakesItsRegistrationsBackOnceTheLastOneFirst)
     EXPECT_EQ(m_cadrel->terminate(), ResultOk);
     m_cadrel.reset();
     EXPECT_EQ(registries->removed.size(), 3U);
+}
+
+TEST_F(CadrelTest, DrawsNoPicturesAfterItsEndWhenProjectsChange)
+{
+    m_cadrel->initialize(m_application.context());
+    const auto pictures = picturesOf(m_application);
+    ASSERT_NE(pictures, nullptr);
+    const auto isDrawn = [&](std::size_t side) { return pictures->getImage(side).getPixelAt(0, 0).isOpaque(); };
+    {
+        // A window has it drawn that there is no video.
+        PictureWatch window(*pictures);
+        pictures->setImageSize(16, 9);
+        m_application.idle();
+        EXPECT_TRUE(isDrawn(VideoProviderBase::OldSide));
+        pictures->setImageSize(32, 18);
+    }
+
+    // The Host lives on, and JUCE doesn't.
+    m_cadrel->terminate();
+    m_application.activateProject(&m_application.createProject());
+    m_application.idle();
+    m_application.idle();
+    EXPECT_FALSE(isDrawn(VideoProviderBase::OldSide));
+    EXPECT_FALSE(isDrawn(VideoProviderBase::NewSide));
+
+    m_cadrel->initialize(m_application.context());
+    const PictureWatch window(*pictures);
+    m_application.idle();
+    EXPECT_TRUE(isDrawn(VideoProviderBase::OldSide));
+    EXPECT_TRUE(isDrawn(VideoProviderBase::NewSide));
 }
 
 TEST_F(CadrelTest, MakesNoViewBeforeItIsInitialised)

@@ -75,6 +75,12 @@ std::shared_ptr<VideoProviderBase> picturesOf(standin::Application& application)
     return nullptr;
 }
 
+/// Looks at the pictures, so that they are drawn.
+class Watch : public VideoProviderBase::Listener {
+public:
+    void imageChanged(std::size_t) override {}
+};
+
 /// Ends the process: 0 when the module has stayed for a thread that had to be left, and that thread has come to its end.
 [[noreturn]] void leaveAThreadAlone()
 {
@@ -90,9 +96,12 @@ std::shared_ptr<VideoProviderBase> picturesOf(standin::Application& application)
     if (!pictures)
         _exit(2);
     const std::set<pid_t> before = threads();
+    Watch window;
+    pictures->addListener(&window);
     pictures->setImageSize(16, 9);
-    pictures.reset();
     host.application.idle();
+    pictures->removeListener(&window);
+    pictures.reset();
     // The old picture alone is there, and has a thread of its own.
     const std::set<pid_t> after = threads();
     if (after.size() != before.size() + 1)

@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "gui/main/CutCommands.h"
+
+#include "core/edl/EventBase.h"
+#include "core/model/DataModel.h"
+#include "core/model/DataModelCommandCreator.h"
+#include "gui/files/FilledText.h"
+#include "gui/guard/Guard.h"
+#include "gui/look/ShownText.h"
+#include "util/Result.h"
+#include "util/Utf8Text.h"
+
+#include <cstddef>
+
+namespace cadrel::gui {
+
+using core::DataModel;
+using core::EventList;
+using core::FailureAnswer;
+using core::GenerationFailure;
+using core::ListKind;
+using util::Result;
+
+namespace {
+
+const wchar_t* nameOfClearing(std::int32_t listKind)
+{
+    switch (listKind) {
+    case ListKind::Old:
+        return L"Delete Old EDL";
+    case ListKind::New:
+        return L"Delete New EDL";
+    default:
+        return L"Delete Change EDL";
+    }
+}
+
+/// "5, A012C004 (reel3.edl)"; nothing where the failure names no event.
+std::wstring eventText(const GenerationFailure& failure)
+{
+    const auto& event = failure.newEvent ? failure.newEvent : failure.oldEvent;
+    if (!event)
+        return {};
+    std::wstring text = std::to_wstring(event->eventNumber()) + L", " + util::toShownLine(event->rollName());
+    if (!event->edlFileName().empty())
+        text += L" (" + util::toShownLine(event->edlFileName()) + L")";
+    return text;
+}
+
+std::wstring failureText(Result::Type result)
+{
+    try {
+        throw result;
+    } catch (...) {
+        return translated(L"No Change EDL could be made.") + L"\n" + translated(Guard::messageOfFailure());
+    }
+}
+
+std::wstring passedOverText(std::size_t count, const GenerationFailure& first)
+{
+    return filled(translated(L"Events that can't be matched, since a timecode would lie outside of the day: %s"),
+                  std::to_wstring(count)) +
+           L"\n" + filled(translated(L"The first is event %s."), eventText(first));
+}
+
+} // namespace
+
+EventList& CutCommands::listOf(DataModel& model, std::int32_t listKind)
+{
+    switch (listKind) {
+    case ListKind::Old:
+        return model.oldEdl();
+    case ListKind::New:
+        return model.newEdl();
+    case ListKind::Change:
+        return model.changeEdl();
+    default:
+        throw Result::InvalidArgument;
+    }
+}
+
+void CutCommands::clear(DataModel& model, std::int32_t listKind)
+{
+    EventList& list = listOf(model, listKind);
+    const auto command = core::createDataModelCommand(translated(nameOfClearing(listKind)));
+    list.clear();
+}
+
+std::wstring CutCommands::generate(DataModel& model)
+{
+    GenerationFailure first;
+    std::size_t passedOver = 0;
+    const auto passOver = [&](const GenerationFailure& failure) {
+        if (passedOver++ == 0)
+            first = failure;
+        return FailureAnswer::PassOver;
+    };
+    const auto command = core::createDataModelCommand(translated(L"Generate Change EDL"));
+    const Result::Type result = model.generateChangeEdl(passOver);
+    if (result != Result::Ok)
+        return failureText(result);
+    std::wstring told;
+    if (model.changeEdl().isEmpty())
+        told = translated(L"Nothing of the old cut survives in the new one. See that both are of one reel.");
+    if (passedOver > 0)
+        told += (told.empty() ? L"" : L"\n") + passedOverText(passedOver, first);
+    return told;
+}
+
+} // namespace cadrel::gui
