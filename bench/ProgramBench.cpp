@@ -19,6 +19,7 @@
 #include <fstream>
 #include <iomanip>
 #include <numeric>
+#include <random>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -29,6 +30,7 @@ using namespace cadrel::bench;
 
 struct Measured {
     double seconds;
+    double processorSeconds; ///< which other programs on the machine hardly change
     double megabytes;
 };
 
@@ -53,7 +55,11 @@ Measured measure(const std::vector<std::string>& command)
     if (child < 0 || wait4(child, &status, 0, &usage) != child || status != 0)
         throw std::runtime_error("Cannot measure " + command[0] + " " + command[1]);
     const std::chrono::duration<double> taken = std::chrono::steady_clock::now() - start;
-    return {taken.count(), static_cast<double>(usage.ru_maxrss) * 1024 / 1e6};
+    const auto secondsOf = [](const timeval& time) {
+        return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6;
+    };
+    return {taken.count(), secondsOf(usage.ru_utime) + secondsOf(usage.ru_stime),
+            static_cast<double>(usage.ru_maxrss) * 1024 / 1e6};
 }
 
 constexpr std::size_t Runs = 7;
@@ -108,6 +114,29 @@ double slowestNotes(const std::string& program, const std::filesystem::path& fol
     return slowest;
 }
 
+/// Shots of one roll from anywhere in an hour of it, so that much of it is used over and over.
+Cut makeCutOfOneRoll(std::size_t shotCount, std::uint32_t seed)
+{
+    std::mt19937 random(seed);
+    Cut cut;
+    for (std::size_t shot = 0; shot < shotCount; ++shot) {
+        const auto source = static_cast<std::uint32_t>(random() % 86'400);
+        cut.push_back({1, source, static_cast<std::uint32_t>(12 + random() % 49)});
+    }
+    return cut;
+}
+
+/// The notes of two cuts of 20,000 such shots, in processor seconds.
+double notesOfOneRoll(const std::string& program, const std::filesystem::path& folder, const std::string& extension)
+{
+    const std::string stem = (folder / "roll").string();
+    writeEdl(stem + "_old.edl", makeCutOfOneRoll(20'000, 1));
+    writeEdl(stem + "_new.edl", makeCutOfOneRoll(20'000, 2));
+    return measure({program, "notes", "--old", stem + "_old.edl", "--new", stem + "_new.edl", "-o", stem + extension,
+                    "--overwrite"})
+        .processorSeconds;
+}
+
 std::vector<std::string> generateCommand(const std::string& program, const std::filesystem::path& folder,
                                          std::size_t shotCount)
 {
@@ -150,11 +179,10 @@ std::vector<std::string> applyCommand(const std::string& program, const std::fil
             stem + "_new.edl", "-o",    stem + "_new.stage", "--overwrite", "--summary"};
 }
 
-/// A project of many tracks for a film of 100,000 events: clips end to end, and a curve with as many points.
-void writeWideProject(const std::string& path, double seconds)
+/// A project of 200 tracks: clips end to end through the film, and a curve with as many points.
+void writeWideProject(const std::string& path, double seconds, int clipCount)
 {
     constexpr int TrackCount = 200;
-    constexpr int ClipCount = 500;
     std::ofstream file(path);
     file << std::setprecision(17) << R"({"format": "stage", "version": 1, "framesPerSecond": 24, "dropFrame": false,
 "pulledDown": false, "timeOrigin": 0, "end": 0, "position": 0, "leftLocator": 0, "rightLocator": 0, "cycleStart": 0,
@@ -162,12 +190,12 @@ void writeWideProject(const std::string& path, double seconds)
 "tracks": [)";
     for (int track = 0; track < TrackCount; ++track) {
         file << (track == 0 ? "\n" : ",\n") << R"({"kind": "audio", "name": "T)" << track << R"(", "events": [)";
-        for (int clip = 0; clip < ClipCount; ++clip)
-            file << (clip == 0 ? "" : ",\n") << R"({"kind": "clip", "clip": 1, "start": )" << seconds * clip / ClipCount
-                 << R"(, "end": )" << seconds * (clip + 1) / ClipCount << "}";
+        for (int clip = 0; clip < clipCount; ++clip)
+            file << (clip == 0 ? "" : ",\n") << R"({"kind": "clip", "clip": 1, "start": )" << seconds * clip / clipCount
+                 << R"(, "end": )" << seconds * (clip + 1) / clipCount << "}";
         file << R"(], "curves": [{"number": 1, "automates": "volume", "points": [)";
-        for (int point = 0; point < ClipCount; ++point)
-            file << (point == 0 ? "" : ", ") << R"({"time": )" << seconds * point / ClipCount << R"(, "value": )"
+        for (int point = 0; point < clipCount; ++point)
+            file << (point == 0 ? "" : ", ") << R"({"time": )" << seconds * point / clipCount << R"(, "value": )"
                  << 0.125 * (point % 7) << "}";
         file << "]}]}";
     }
@@ -176,15 +204,37 @@ void writeWideProject(const std::string& path, double seconds)
         throw std::runtime_error("Cannot write " + path);
 }
 
+double secondsOf(const Cut& cut)
+{
+    return std::accumulate(cut.begin(), cut.end(), 0.0,
+                           [](double sum, const Shot& shot) { return sum + shot.length; }) /
+           24.0;
+}
+
+/// Carries a million clips on 200 tracks over to a cut with 2,000 changes, in processor seconds. `more` says which notes are
+/// written.
+double applyToManyClips(const std::string& program, const std::filesystem::path& folder,
+                        const std::vector<std::string>& more)
+{
+    const std::string stem = (folder / "many").string();
+    const Cut oldCut = makeCut(20'000);
+    writeEdl(stem + "_old.edl", oldCut);
+    writeEdl(stem + "_new.edl", recut(oldCut, 2'000));
+    writeWideProject(stem + ".stage", secondsOf(oldCut), 5'000);
+    std::vector<std::string> command{
+        program,           "apply", stem + ".stage",     "--old",       stem + "_old.edl", "--new",
+        stem + "_new.edl", "-o",    stem + "_new.stage", "--overwrite", "--summary"};
+    command.insert(command.end(), more.begin(), more.end());
+    return measure(command).processorSeconds;
+}
+
 /// Plans a run of 100,000 events and 200 tracks; onto itself, so that the plan is all there is to do.
 std::vector<std::string> planCommand(const std::string& program, const std::filesystem::path& folder)
 {
     const std::string stem = (folder / "wide").string();
     const Cut cut = makeCut(100'000);
-    const auto frames =
-        std::accumulate(cut.begin(), cut.end(), 0.0, [](double sum, const Shot& shot) { return sum + shot.length; });
     writeEdl(stem + ".edl", cut);
-    writeWideProject(stem + ".stage", frames / 24.0);
+    writeWideProject(stem + ".stage", secondsOf(cut), 500);
     return {program,       "apply", stem + ".stage",     "--old",       stem + ".edl", "--new",
             stem + ".edl", "-o",    stem + "_new.stage", "--overwrite", "--summary"};
 }
@@ -217,6 +267,20 @@ bool run(const std::string& program, const std::filesystem::path& folder)
     kept &= report("apply, 100,000 events onto themselves, 200 tracks", medianSeconds(planCommand(program, folder)), 6,
                    "s");
     kept &= report("notes of 20,000 events, 2,000 changes, slowest form", slowestNotes(program, folder), 2, "s");
+    for (const std::string extension : {".txt", ".csv", ".json", ".html"}) {
+        const std::string what = "notes of 20,000 events of one roll, " + extension + ", processor";
+        kept &= report(what.c_str(), notesOfOneRoll(program, folder, extension), 2, "s");
+    }
+    kept &=
+        report("notes of 20,000 events of one roll, .pdf, processor", notesOfOneRoll(program, folder, ".pdf"), 4, "s");
+    const double withoutNotes = applyToManyClips(program, folder, {});
+    std::printf("%-60s %9.3f s\n", "apply, 1,000,000 clips, 2,000 changes, processor", withoutNotes);
+    for (const std::string extension : {".txt", ".json"}) {
+        const std::string what = "the same with " + extension + " notes, against that";
+        const double withNotes =
+            applyToManyClips(program, folder, {"--notes", (folder / ("many" + extension)).string()});
+        kept &= report(what.c_str(), withNotes / withoutNotes, 1.3, "x");
+    }
     kept &= report("list --summary of 1,000,000 events, most memory", megabytes, 900, "MB");
     return kept;
 }

@@ -6,17 +6,17 @@
 set -eu
 
 needed="build-essential cmake libcli11-dev nlohmann-json3-dev libpugixml-dev juce-modules-source libgtest-dev librapidcheck-dev
-libvalijson-dev libcairo2-dev pkg-config libx11-dev libxext-dev libxinerama-dev libxrandr-dev libxcursor-dev libxtst-dev xvfb"
+libvalijson-dev libcairo2-dev libpango1.0-dev pkg-config libx11-dev libxext-dev libxinerama-dev libxrandr-dev libxcursor-dev libxtst-dev xvfb"
 helpful="ninja-build ccache"
 case $1 in
 release) needed="$needed libbenchmark-dev" ;;
 asan | fuzz) needed="$needed clang libclang-rt-14-dev" ;;
 tests)
-    needed="chromium poppler-utils"
+    needed="chromium poppler-utils fonts-dejavu-core fonts-droid-fallback"
     helpful=""
     ;;
 pictures)
-    needed="chromium poppler-utils pngquant fonts-dejavu-core"
+    needed="chromium poppler-utils pngquant fonts-dejavu-core fonts-droid-fallback"
     helpful=""
     ;;
 format)

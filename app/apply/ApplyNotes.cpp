@@ -12,6 +12,8 @@
 #include "standin/base/Utf16.h"
 #include "util/StringUtil.h"
 
+#include <algorithm>
+#include <cstddef>
 #include <utility>
 #include <vector>
 
@@ -49,6 +51,34 @@ const TrackComparison* sceneTrackOf(const ApplyFacts& facts, const core::ChangeN
         }
     }
     return scenes;
+}
+
+/// The names that a text consists of, each with a blank after it. They may have blanks themselves; of two that fit, the longer
+/// one is meant if the rest fits then. The whole text where it consists of something else.
+std::vector<std::string> namesIn(const std::string& text, const std::vector<std::string>& names)
+{
+    std::vector<std::string> sorted = names;
+    std::sort(sorted.begin(), sorted.end(),
+              [](const std::string& a, const std::string& b) { return a.size() > b.size(); });
+    // From the end on: which name comes first in the rest of the text, where all of the rest consists of names.
+    std::vector<const std::string*> firstName(text.size() + 1, nullptr);
+    for (std::size_t at = text.size(); at-- > 0;) {
+        for (const std::string& name : sorted) {
+            const std::size_t after = at + name.size() + 1;
+            const bool fits =
+                after <= text.size() && text[after - 1] == ' ' && text.compare(at, name.size(), name) == 0;
+            if (fits && (after == text.size() || firstName[after] != nullptr)) {
+                firstName[at] = &name;
+                break;
+            }
+        }
+    }
+    std::vector<std::string> found;
+    for (std::size_t at = 0; at < text.size() && firstName[at] != nullptr; at += found.back().size() + 1)
+        found.push_back(*firstName[at]);
+    if (found.empty())
+        found.push_back(text.substr(0, text.find_last_not_of(' ') + 1));
+    return found;
 }
 
 /// Gathers what the comparison of the project says, in seconds of the project's clock.
@@ -130,22 +160,24 @@ private:
     }
 
     /// The tracks that the name of an automation warning tells.
-    static std::string tracksOf(const Placement& marker)
+    static std::vector<std::string> tracksOf(const Placement& marker, const std::vector<std::string>& tracks)
     {
         const std::string start = util::StringUtil::toUtf8(core::AutomationWarningDetectAlgorithm::NameStart);
         std::string name = toUtf8(marker.name);
         name.erase(0, name.starts_with(start) ? start.size() : 0);
-        name.erase(name.find_last_not_of(' ') + 1);
-        return name;
+        return namesIn(name, tracks);
     }
 
     void addJumps(const ApplyFacts& facts)
     {
+        std::vector<std::string> tracks;
+        for (const TrackComparison& track : facts.tracks)
+            tracks.push_back(toUtf8(track.track->name()));
         for (const TrackComparison* const track : facts.markedTracks()) {
             if (markerRoleOf(*track->track) != host::TrackRole::AutomationWarning)
                 continue;
             for (const Placement& marker : track->added)
-                m_found.jumps.push_back({onClock(marker), tracksOf(marker)});
+                m_found.jumps.push_back({onClock(marker), tracksOf(marker, tracks)});
         }
     }
 

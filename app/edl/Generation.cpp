@@ -12,6 +12,7 @@
 #include "core/settings/VfxNameMatcher.h"
 #include "util/Result.h"
 
+#include <algorithm>
 #include <cstddef>
 #include <list>
 #include <utility>
@@ -176,6 +177,9 @@ ReadFiles takeEvents(std::list<LoadedEdl> edls, EventList& events)
         EdlLoader::refuseUnreadable(edl);
         events.append(edl.events.release());
         read.names.push_back(fileNameOf(edl.path));
+        const std::string& title = edl.remarks.title;
+        if (!title.empty() && std::find(read.titles.begin(), read.titles.end(), title) == read.titles.end())
+            read.titles.push_back(title);
         read.unread.push_back({fileNameOf(edl.path), std::move(edl.remarks.unreadLines)});
     }
     return read;
@@ -185,8 +189,11 @@ ReadFiles loadCut(const std::vector<std::string>& files, EventList& events, cons
                   Terminal& terminal)
 {
     std::list<LoadedEdl> edls = EdlLoader(options, terminal).load(files);
-    requireParted(edls, options.refusesSameTimecodes || options.strict, terminal);
-    return takeEvents(std::move(edls), events);
+    std::vector<std::string> overlapping =
+        requireParted(edls, options.refusesSameTimecodes || options.strict, terminal);
+    ReadFiles read = takeEvents(std::move(edls), events);
+    read.overlapping = std::move(overlapping);
+    return read;
 }
 
 } // namespace
@@ -207,7 +214,15 @@ Cuts loadCuts(DataModel& model, const GenerationOptions& options, Terminal& term
             std::move(newFiles.names),
             std::move(oldFiles.unread),
             std::move(newFiles.unread),
+<<<<<<< 679229a
+            std::move(oldFiles.overlapping),
+            std::move(newFiles.overlapping),
             {}};
+=======
+            {},
+            std::move(oldFiles.titles),
+            std::move(newFiles.titles)};
+>>>>>>> f10d725
 }
 
 Cuts generateChangeEdl(DataModel& model, const GenerationOptions& options, Terminal& terminal)

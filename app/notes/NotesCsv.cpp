@@ -6,6 +6,7 @@
 #include "app/notes/SoundWording.h"
 #include "core/edl/EventBase.h"
 
+#include <algorithm>
 #include <array>
 #include <string>
 
@@ -40,7 +41,10 @@ std::string inQuotes(const std::string& text)
 /// A text of the cut, which no spreadsheet may take for a formula.
 std::string asText(const std::string& text)
 {
-    const bool looksLikeFormula = !text.empty() && std::string_view("=+-@\t\r").find(text.front()) != std::string::npos;
+    // The last four are those of a Japanese keyboard, which some programs take for the same.
+    constexpr std::array<std::string_view, 10> Starts{"=", "+", "-", "@", "\t", "\r", "＝", "＋", "－", "＠"};
+    const bool looksLikeFormula =
+        std::any_of(Starts.begin(), Starts.end(), [&text](std::string_view start) { return text.starts_with(start); });
     return inQuotes(looksLikeFormula ? "'" + text : text);
 }
 

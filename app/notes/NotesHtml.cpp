@@ -11,9 +11,11 @@
 #include <algorithm>
 #include <array>
 #include <map>
+#include <optional>
 #include <set>
 #include <string>
 #include <utility>
+#include <vector>
 
 namespace cadrel::app {
 
@@ -32,7 +34,10 @@ constexpr int NewTop = 164;
 constexpr int NewBottom = 190;
 constexpr int Middle = (OldBottom + NewTop) / 2;
 
-/// What the boxes of the filter show, and the label on a line.
+/// A mark that is shorter than this part of the picture may be thinner than a pixel, and gets a stroke.
+constexpr std::int32_t ThinPart = 400;
+
+/// The box of the filter, which gives the hue, and the label on a line.
 struct KindLabel {
     const char* filter;
     const char* label;
@@ -59,6 +64,8 @@ KindLabel labelOf(ChangeKind kind)
         return {"retimed", "speed"};
     case ChangeKind::VersionChanged:
         return {"version", "version"};
+    case ChangeKind::Unchanged:
+        return {"trimmed", "unchanged"};
     case ChangeKind::TransitionAdded:
     case ChangeKind::TransitionRemoved:
     case ChangeKind::TransitionChanged:
@@ -70,19 +77,13 @@ KindLabel labelOf(ChangeKind kind)
 struct Filter {
     const char* value;
     const char* label;
-    const char* hue; ///< the colour of its marks
 };
 
-constexpr std::array Filters{Filter{"kept", "kept", "kept"},
-                             Filter{"trimmed", "trimmed", "lifted"},
-                             Filter{"lifted", "lifted", "lifted"},
-                             Filter{"inserted", "inserted", "inserted"},
-                             Filter{"replaced", "replaced", "other"},
-                             Filter{"moved", "moved", "moved"},
-                             Filter{"doubled", "doubled", "doubled"},
-                             Filter{"retimed", "retimed", "other"},
-                             Filter{"version", "VFX version", "other"},
-                             Filter{"transition", "transitions", "other"}};
+constexpr std::array Filters{Filter{"kept", "kept"},           Filter{"trimmed", "trimmed"},
+                             Filter{"lifted", "lifted"},       Filter{"inserted", "inserted"},
+                             Filter{"replaced", "replaced"},   Filter{"moved", "moved"},
+                             Filter{"doubled", "doubled"},     Filter{"retimed", "retimed"},
+                             Filter{"version", "VFX version"}, Filter{"transition", "transitions"}};
 
 std::string escaped(const std::string& text)
 {
@@ -108,11 +109,35 @@ std::string escaped(const std::string& text)
     return html;
 }
 
+/// Whether every one of the frames belongs to a change.
+bool areTold(const FrameSpan& frames, const std::vector<PictureChange>& changes,
+             std::optional<FrameSpan> PictureChange::*span)
+{
+    std::vector<FrameSpan> told;
+    for (const PictureChange& change : changes) {
+        if (change.*span)
+            told.push_back(*(change.*span));
+    }
+    std::sort(told.begin(), told.end(), [](const FrameSpan& a, const FrameSpan& b) { return a.start < b.start; });
+    std::int32_t next = frames.start;
+    for (const FrameSpan& stretch : told)
+        next = stretch.start <= next ? std::max(next, stretch.end()) : next;
+    return next >= frames.end();
+}
+
 class HtmlForm {
 public:
     HtmlForm(const NotesDocument& document, const NotesSink& sink)
-        : m_document(document), m_words(document), m_sink(sink)
+        : m_document(document), m_words(document), m_sink(sink),
+          m_width(std::max({1, document.notes.oldCut().length(), document.notes.newCut().length()}))
     {
+        for (std::size_t reel = 0; reel < document.notes.reels().size(); ++reel) {
+            std::size_t count = 0;
+            for (const NoteEntry& entry : document.notes.reels()[reel].entries) {
+                if (entry.moveEnd() != nullptr)
+                    m_moveEnds[entry.moveEnd()->step] = moveEndId(reel, ++count);
+            }
+        }
     }
 
     void write()
@@ -175,9 +200,8 @@ private:
     void writePicture()
     {
         const auto& notes = m_document.notes;
-        const std::int32_t width = std::max({1, notes.oldCut().length(), notes.newCut().length()});
         m_sink("<div class=\"strip\"><div><span>old cut</span><span class=\"tc\">" + timesOf(notes.oldCut()) +
-               "</span></div>\n" + numbersOf(true) + "<svg viewBox=\"0 0 " + std::to_string(width) +
+               "</span></div>\n" + numbersOf(true) + "<svg viewBox=\"0 0 " + std::to_string(m_width) +
                " 190\" preserveAspectRatio=\"none\" tabindex=\"0\" role=\"img\" aria-label=\"Old and new programme; "
                "plus and minus zoom, the arrows go along\">\n" +
                box({0, notes.oldCut().length()}, true, "base", {}, {}) +
@@ -238,9 +262,12 @@ private:
                                      stretch->newEnd() <= rangeOf(*move).end();
                 ++kept;
                 if (isMoved == movesAlone)
-                    drawKept(*stretch, isMoved ? "moved" : "kept", isMoved ? idOf(*move) : keptId(reel, kept));
+                    drawKept({stretch->oldStart, stretch->length}, {stretch->newStart, stretch->length},
+                             isMoved ? "moved" : "kept", (isMoved ? idsOf(*move) + " " : "") + keptId(reel, kept));
                 continue;
             }
+            if (entry.step() == nullptr)
+                continue;
             if (entry.step()->action == core::StepAction::Move)
                 m_moves[rangeOf(entry).start] = &entry;
             else if (movesAlone)
@@ -254,54 +281,85 @@ private:
     {
         return concatenated({"k", std::to_string(reel + 1), "-", std::to_string(kept)});
     }
-
-    void drawKept(const core::KeptStretch& kept, const std::string& kind, const std::string& id)
+    static std::string moveEndId(std::size_t reel, std::size_t number)
     {
-        const FrameSpan inOld{kept.oldStart, kept.length};
-        const FrameSpan inNew{kept.newStart, kept.length};
-        const std::string boxKind = kind == "moved" ? "moved" : "seen";
-        m_sink(box(inOld, true, boxKind, id, {}) + box(inNew, false, boxKind, id, {}) + band(inOld, inNew, kind, id));
+        return concatenated({"m", std::to_string(reel + 1), "-", std::to_string(number)});
     }
 
+    /// The lines of a move: its step, and that of its other end.
+    std::string idsOf(const NoteEntry& move) const
+    {
+        const auto end = m_moveEnds.find(move.number);
+        return end == m_moveEnds.end() ? idOf(move) : concatenated({idOf(move), " ", end->second});
+    }
+
+    void drawKept(const FrameSpan& inOld, const FrameSpan& inNew, const std::string& kind, const std::string& ids)
+    {
+        m_sink(box(inOld, true, kind, ids, {}) + box(inNew, false, kind, ids, {}) + band(inOld, inNew, kind, ids));
+    }
+
+    /// Each change in the hue of its kind. What no change tells of has that of the largest one.
     void drawStep(const NoteEntry& entry)
     {
         const NoteStep& step = *entry.step();
+        const std::string id = idOf(entry);
         const std::string title = m_words.action(entry);
-        for (const FrameSpan& removed : step.removedFrames)
-            m_sink(box(removed, true, "lifted", idOf(entry), title));
-        if (step.inserted.length > 0)
-            m_sink(box(step.inserted, false, step.action == core::StepAction::Relabel ? "version" : "inserted",
-                       idOf(entry), title));
-        for (const PictureChange& change : step.changes) {
-            if (change.kind == ChangeKind::Doubled)
-                m_sink(band(*change.inOld, *change.inNew, "doubled", idOf(entry)));
+        const char* const kind = labelOf(NotesWording::largestChange(entry).kind).filter;
+        for (const FrameSpan& removed : step.removedFrames) {
+            if (!areTold(removed, step.changes, &PictureChange::inOld))
+                m_sink(box(removed, true, kind, id, title));
         }
+        if (!areTold(step.inserted, step.changes, &PictureChange::inNew))
+            m_sink(box(step.inserted, false, kind, id, title));
+        for (const PictureChange& change : step.changes)
+            drawChange(change, step, id, title);
     }
 
-    static std::string box(const FrameSpan& frames, bool isOld, const std::string& kind, const std::string& id,
-                           const std::string& title)
+    void drawChange(const PictureChange& change, const NoteStep& step, const std::string& id, const std::string& title)
     {
-        return "<rect class=\"" + kind + "\" x=\"" + std::to_string(frames.start) + "\" y=\"" +
+        if (change.kind == ChangeKind::Unchanged) {
+            drawKept(*change.inOld, *change.inNew, "kept", id);
+            return;
+        }
+        const char* const kind = labelOf(change.kind).filter;
+        if (change.kind == ChangeKind::Doubled)
+            m_sink(band(*change.inOld, *change.inNew, kind, id));
+        else if (change.inOld && step.action == core::StepAction::Replace)
+            m_sink(box(*change.inOld, true, kind, id, title));
+        if (change.inNew)
+            m_sink(box(*change.inNew, false, kind, id, title));
+    }
+
+    std::string classOf(const std::string& kind, std::int32_t frames) const
+    {
+        return frames < m_width / ThinPart ? kind + " thin" : kind;
+    }
+
+    std::string box(const FrameSpan& frames, bool isOld, const std::string& kind, const std::string& ids,
+                    const std::string& title) const
+    {
+        return "<rect class=\"" + classOf(kind, frames.length) + "\" x=\"" + std::to_string(frames.start) + "\" y=\"" +
                std::to_string(isOld ? OldTop : NewTop) + "\" width=\"" + std::to_string(frames.length) +
-               "\" height=\"" + std::to_string(OldBottom - OldTop) + "\"" + dataOf(id) +
+               "\" height=\"" + std::to_string(OldBottom - OldTop) + "\"" + dataOf(ids) +
                (title.empty() ? "/>\n" : "><title>" + escaped(title) + "</title></rect>\n");
     }
 
-    static std::string dataOf(const std::string& id)
+    /// The lines of the table that a mark belongs to.
+    static std::string dataOf(const std::string& ids)
     {
-        return id.empty() ? "" : concatenated({" data-step=\"", id, "\""});
+        return ids.empty() ? "" : concatenated({" data-rows=\"", ids, "\""});
     }
 
-    static std::string band(const FrameSpan& inOld, const FrameSpan& inNew, const std::string& kind,
-                            const std::string& id)
+    std::string band(const FrameSpan& inOld, const FrameSpan& inNew, const std::string& kind,
+                     const std::string& ids) const
     {
         const auto point = [](std::int32_t x, int y) { return std::to_string(x) + " " + std::to_string(y); };
         const auto curve = [&point](std::int32_t fromX, std::int32_t toX, int toY) {
             return concatenated({"C", point(fromX, Middle), " ", point(toX, Middle), " ", point(toX, toY)});
         };
-        return "<path class=\"" + kind + "\"" + dataOf(id) + " d=\"M" + point(inOld.start, OldBottom) +
-               curve(inOld.start, inNew.start, NewTop) + "L" + point(inNew.end(), NewTop) +
-               curve(inNew.end(), inOld.end(), OldBottom) + "Z\"/>\n";
+        return "<path class=\"" + classOf(kind, inNew.length) + "\"" + dataOf(ids) + " d=\"M" +
+               point(inOld.start, OldBottom) + curve(inOld.start, inNew.start, NewTop) + "L" +
+               point(inNew.end(), NewTop) + curve(inNew.end(), inOld.end(), OldBottom) + "Z\"/>\n";
     }
 
     void writeTools()
@@ -309,10 +367,10 @@ private:
         m_sink("<div class=\"tools\"><button data-zoom=\"0.6\">zoom in</button><button data-zoom=\"1.7\">zoom "
                "out</button><button data-zoom=\"1e9\">all</button>");
         const std::set<std::string> kinds = kindsOfAll();
-        for (const auto& [value, label, hue] : Filters) {
+        for (const auto& [value, label] : Filters) {
             if (kinds.contains(value))
-                m_sink(concatenated({"<label><input type=\"checkbox\" checked value=\"", value,
-                                     "\"><i style=\"--hue: var(--", hue, ")\"></i>", label, "</label>"}));
+                m_sink(concatenated({"<label><input type=\"checkbox\" checked value=\"", value, "\"><i class=\"", value,
+                                     "\"></i>", label, "</label>"}));
         }
         if (m_document.sound != nullptr)
             m_sink("<button data-sound>all sound</button>");
@@ -325,11 +383,12 @@ private:
         std::set<std::string> kinds;
         for (const core::ReelNotes& reel : m_document.notes.reels()) {
             for (const NoteEntry& entry : reel.entries) {
-                if (entry.step() == nullptr)
+                if (entry.kept() != nullptr)
                     kinds.insert("kept");
-                else
-                    for (const PictureChange& change : entry.step()->changes)
-                        kinds.insert(labelOf(change.kind).filter);
+                if (entry.step() == nullptr)
+                    continue;
+                for (const PictureChange& change : entry.step()->changes)
+                    kinds.insert(labelOf(change.kind).filter);
             }
         }
         return kinds;
@@ -365,8 +424,8 @@ private:
         for (std::size_t reel = 0; reel < reels.size(); ++reel) {
             const std::string number = std::to_string(reel + 1);
             const std::size_t steps = m_words.stepsOf(reel);
-            m_sink(concatenated({"<tr", steps == 0 ? " class=\"k\"" : "", "><td><a href=\"#r", number, "\">Reel ",
-                                 number, "</a></td><td class=\"tc\">", m_words.reelStart(reel),
+            m_sink(concatenated({"<tr", reels[reel].isUnchanged() ? " class=\"k\"" : "", "><td><a href=\"#r", number,
+                                 "\">Reel ", number, "</a></td><td class=\"tc\">", m_words.reelStart(reel),
                                  "</td><td class=\"tc\">", m_words.timecode(reels[reel].before),
                                  "</td><td class=\"tc\">", m_words.timecode(reels[reel].after),
                                  "</td><td class=\"tc num\">", m_words.change(reels[reel].after - reels[reel].before),
@@ -385,36 +444,50 @@ private:
                "changes</th><th class=\"num\">length</th><th class=\"num\">offset</th></tr></thead>\n<tbody>\n");
         std::size_t kept = 0;
         for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
-            m_sink(entry.step() == nullptr ? rowOf(entry, reel, keptId(reel, ++kept))
-                                           : rowOf(entry, reel, idOf(entry)));
+            m_sink(rowOf(entry, reel,
+                         entry.step() != nullptr   ? idOf(entry)
+                         : entry.kept() != nullptr ? keptId(reel, ++kept)
+                                                   : m_moveEnds.at(entry.moveEnd()->step)));
         m_sink("</tbody>\n</table></div>\n");
     }
 
     std::string rowOf(const NoteEntry& entry, std::size_t reel, const std::string& id) const
     {
-        const bool isKept = entry.step() == nullptr;
+        const bool isStep = entry.step() != nullptr;
         const auto cell = [](const std::string& kind, const std::string& html) {
             return concatenated({"<td class=\"", kind, "\">", html, "</td>"});
         };
         std::string feet;
-        if (m_document.layout.showsFeet && !isKept)
+        if (m_document.layout.showsFeet && isStep)
             feet = "<p class=\"change\"><small>" + escaped(m_words.inFeet(entry)) + "</small></p>";
-        return "<tr id=\"" + id + "\" tabindex=\"0\"" + (isKept ? " class=\"k\"" : "") + " data-kinds=\"" +
-               (isKept ? "kept" : filtersOf(*entry.step())) + "\">" +
-               cell("num", isKept ? "" : std::to_string(entry.number)) +
+        return "<tr id=\"" + id + "\" tabindex=\"0\"" + (isStep ? "" : " class=\"k\"") + " data-kinds=\"" +
+               filtersOf(entry) + "\">" + cell("num", isStep ? std::to_string(entry.number) : "") +
                cell("tc", m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel)))) +
                cell("tc", escaped(m_words.action(entry))) +
-               cell("", isKept ? "" : changesOf(*entry.step()) + feet + soundOf(entry)) +
+               cell("", isStep ? changesOf(*entry.step()) + feet + soundOf(entry) : moveOf(entry)) +
                cell("tc num", entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange)) +
                cell("tc num", m_words.change(entry.runningOffset)) + "</tr>\n";
     }
 
-    static std::string filtersOf(const NoteStep& step)
+    static std::string filtersOf(const NoteEntry& entry)
     {
+        if (entry.step() == nullptr)
+            return entry.kept() != nullptr ? "kept" : "moved";
         std::string kinds;
-        for (const PictureChange& change : step.changes)
+        for (const PictureChange& change : entry.step()->changes)
             kinds.append(kinds.empty() ? "" : " ").append(labelOf(change.kind).filter);
         return kinds;
+    }
+
+    /// The shots at the other end of a move, with a way to its step; empty for a kept stretch.
+    std::string moveOf(const NoteEntry& entry) const
+    {
+        const core::MoveEnd* const end = entry.moveEnd();
+        if (end == nullptr)
+            return {};
+        const std::string number = std::to_string(end->step);
+        return concatenated(
+            {"<a href=\"#s", number, "\">step ", number, "</a>: ", escaped(m_words.describe(end->move).shot)});
     }
 
     /// The label stands before it already.
@@ -428,11 +501,10 @@ private:
         std::string html;
         for (const PictureChange& change : step.changes) {
             const ChangeWords words = m_words.describe(change);
-            const bool isLonger =
-                change.frames > 0 && (change.kind == ChangeKind::HeadTrimmed || change.kind == ChangeKind::TailTrimmed);
-            html += "<p class=\"change\"><span class=\"tag " + (isLonger ? "plus" : std::string(wordOf(change.kind))) +
-                    "\">" + labelOf(change.kind).label + "</span>" + escaped(words.shot) + " <small>" +
-                    escaped(withoutLabel(words.what, labelOf(change.kind).label)) +
+            const auto [filter, label] = labelOf(change.kind);
+            html += concatenated({"<p class=\"change\"><span class=\"tag ",
+                                  change.kind == ChangeKind::Unchanged ? "kept" : filter, "\">", label, "</span>",
+                                  escaped(words.shot), " <small>", escaped(withoutLabel(words.what, label))}) +
                     (words.more.empty() ? "" : ", " + escaped(words.more)) + "</small></p>";
         }
         if (step.joined > 1)
@@ -500,6 +572,8 @@ private:
     const NotesDocument& m_document;
     NotesWording m_words;
     const NotesSink& m_sink;
+    const std::int32_t m_width;                       ///< of the picture, in frames
+    std::map<std::size_t, std::string> m_moveEnds;    ///< the lines of other ends, by the numbers of their steps
     std::map<std::int32_t, const NoteEntry*> m_moves; ///< by their place in the new programme
 };
 

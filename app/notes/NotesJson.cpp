@@ -6,10 +6,12 @@
 #include "app/notes/SoundWording.h"
 #include "app/settings/SettingsReport.h"
 #include "core/edl/EventBase.h"
+#include "standin/file/JsonText.h"
 
 #include <nlohmann/json.hpp>
 #include <optional>
 #include <string>
+#include <string_view>
 
 namespace cadrel::app {
 
@@ -27,44 +29,50 @@ std::string textOf(const ordered_json& value)
     return value.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
 }
 
+/// The text of an object with one more member, whose value is JSON already.
+std::string withMember(const ordered_json& object, std::string_view key, std::string_view value)
+{
+    std::string text = textOf(object);
+    text.pop_back();
+    text.append(",\"").append(key).append("\":").append(value);
+    return text + "}";
+}
+
 class SoundJson {
 public:
     explicit SoundJson(const SoundDocument& document) : m_document(document) {}
 
-    ordered_json whole() const
+    std::string whole() const
     {
         ordered_json tracks = ordered_json::array();
         for (const SoundTrack& track : m_document.tracks)
             tracks.push_back({{"name", track.name}, {"kind", track.kind}, {"folders", track.folders}});
-        return {{"project", m_document.projectName},
-                {"clips", countJson(m_document.clips)},
-                {"markers", countJson(m_document.markers)},
-                {"sceneTrack", m_document.scenes ? ordered_json(*m_document.scenes) : ordered_json()},
-                {"automationWatched", m_document.isWatchingAutomation},
-                {"remarks", m_document.remarks},
-                {"tracks", std::move(tracks)},
-                {"elsewhere", ofStep(m_document.notes.elsewhere())}};
+        return withMember({{"project", m_document.projectName},
+                           {"clips", countJson(m_document.clips)},
+                           {"markers", countJson(m_document.markers)},
+                           {"sceneTrack", m_document.scenes ? ordered_json(*m_document.scenes) : ordered_json()},
+                           {"automationWatched", m_document.isWatchingAutomation},
+                           {"remarks", m_document.remarks},
+                           {"tracks", std::move(tracks)}},
+                          "elsewhere", ofStep(m_document.notes.elsewhere()));
     }
 
-    ordered_json ofStep(const core::StepSound& sound) const
+    std::string ofStep(const core::StepSound& sound) const
     {
-        ordered_json changes = ordered_json::array();
-        for (const core::SoundChange& change : sound.changes)
-            changes.push_back(changeJson(change));
         ordered_json jumps = ordered_json::array();
         for (const core::AutomationJump& jump : sound.jumps) {
-            ordered_json json = rangeJson(jump.place);
-            json["tracks"] = jump.where;
+            ordered_json json{{"in", timeJson(jump.place.start)}, {"out", timeJson(jump.place.end)}};
+            json["tracks"] = jump.tracks;
             jumps.push_back(std::move(json));
         }
         ordered_json tracks = ordered_json::array();
         for (const std::size_t track : sound.tracks)
             tracks.push_back(track + 1);
-        return {{"scenes", sound.scenes},
-                {"tracks", std::move(tracks)},
-                {"movedClips", sound.movedClips},
-                {"changes", std::move(changes)},
-                {"automationJumps", std::move(jumps)}};
+        return withMember({{"scenes", sound.scenes},
+                           {"tracks", std::move(tracks)},
+                           {"movedClips", sound.movedClips},
+                           {"automationJumps", std::move(jumps)}},
+                          "changes", changesText(sound.changes));
     }
 
 private:
@@ -74,31 +82,53 @@ private:
                 {"split", count.split}, {"doubled", count.doubled}, {"inNoCut", count.lost}, {"new", count.added}};
     }
 
-    ordered_json changeJson(const core::SoundChange& change) const
+    /// A film may have a million of them, for which a tree of values would take minutes.
+    std::string changesText(const std::vector<core::SoundChange>& changes) const
     {
-        ordered_json json{{"kind", wordOf(change.kind)},
-                          {"track", change.track + 1},
-                          {"trackName", m_document.tracks.at(change.track).name},
-                          {"on", change.isMarker ? "marker" : "clip"},
-                          {"name", change.name}};
-        if (!change.part.empty())
-            json["part"] = change.part;
-        if (change.kind != core::SoundChangeKind::Added)
-            json["was"] = rangeJson(change.was);
-        if (change.now)
-            json["now"] = rangeJson(*change.now);
-        else
-            json["lost"] = rangeJson(change.lost);
-        return json;
+        std::string json = "[";
+        for (const core::SoundChange& change : changes) {
+            json += json.size() == 1 ? "" : ",";
+            appendChange(json, change);
+        }
+        return json + "]";
     }
 
-    ordered_json rangeJson(const core::SecondsRange& range) const
+    void appendChange(std::string& json, const core::SoundChange& change) const
     {
-        const auto time = [this](double seconds) {
-            const double ofProject = seconds - m_document.clock.origin();
-            return ordered_json{{"seconds", ofProject}, {"timecode", m_document.clock.timecode(ofProject)}};
-        };
-        return {{"in", time(range.start)}, {"out", time(range.end)}};
+        json.append(R"({"kind":")").append(wordOf(change.kind));
+        json.append(R"(","track":)").append(std::to_string(change.track + 1)).append(R"(,"trackName":)");
+        standin::appendJsonText(json, m_document.tracks.at(change.track).name);
+        json.append(R"(,"on":)").append(change.isMarker ? R"("marker")" : R"("clip")").append(R"(,"name":)");
+        standin::appendJsonText(json, change.name);
+        if (!change.part.empty())
+            standin::appendJsonText(json += R"(,"part":)", change.part);
+        if (change.kind != core::SoundChangeKind::Added)
+            appendRange(json += R"(,"was":)", change.was);
+        if (change.now)
+            appendRange(json += R"(,"now":)", *change.now);
+        else
+            appendRange(json += R"(,"lost":)", change.lost);
+        json += '}';
+    }
+
+    void appendRange(std::string& json, const core::SecondsRange& range) const
+    {
+        appendTime(json += R"({"in":)", range.start);
+        appendTime(json += R"(,"out":)", range.end);
+        json += '}';
+    }
+
+    void appendTime(std::string& json, double seconds) const
+    {
+        const double ofProject = seconds - m_document.clock.origin();
+        standin::appendJsonNumber(json += R"({"seconds":)", ofProject);
+        json.append(R"(,"timecode":")").append(m_document.clock.timecode(ofProject)).append(R"("})");
+    }
+
+    ordered_json timeJson(double seconds) const
+    {
+        const double ofProject = seconds - m_document.clock.origin();
+        return {{"seconds", ofProject}, {"timecode", m_document.clock.timecode(ofProject)}};
     }
 
     const SoundDocument& m_document;
@@ -126,7 +156,7 @@ public:
                        {"bridgedGaps", m_document.healing.bridgedGaps}});
         add("largest", largestJson());
         if (m_document.sound != nullptr)
-            add("sound", SoundJson(*m_document.sound).whole());
+            sink(",\n\"sound\": " + SoundJson(*m_document.sound).whole());
         sink(",\n\"reels\": [");
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel)
             writeReel(reel, sink);
@@ -150,6 +180,7 @@ private:
                 {"events", events.size()},
                 {"invalid", events.countInvalid()},
                 {"unread", toJson(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread)},
+                {"overlappingFiles", isNew ? m_document.cuts.newOverlapping : m_document.cuts.oldOverlapping},
                 {"doubts", std::move(doubts)}};
     }
 
@@ -191,10 +222,29 @@ private:
              ", \"new\": " + textOf(reelJson(m_document.notes.newCut(), reel.pair.newReel)) + ", \"rows\": [");
         const char* separator = "\n";
         for (const NoteEntry& entry : reel.entries) {
-            sink(separator + textOf(entry.step() == nullptr ? keptJson(entry) : stepJson(entry)));
+            const core::StepSound* const sound = m_words.soundOf(entry);
+            sink(separator);
+            sink(sound == nullptr ? textOf(rowJson(entry))
+                                  : withMember(rowJson(entry), "sound", SoundJson(*m_document.sound).ofStep(*sound)));
             separator = ",\n";
         }
         sink("\n]}");
+    }
+
+    ordered_json rowJson(const NoteEntry& entry) const
+    {
+        return entry.step() != nullptr ? stepJson(entry) : entry.kept() != nullptr ? keptJson(entry) : movedJson(entry);
+    }
+
+    ordered_json movedJson(const NoteEntry& entry) const
+    {
+        const core::MoveEnd& end = *entry.moveEnd();
+        return {{"row", "moved"},
+                {"step", end.step},
+                {"at", placeJson(end.place)},
+                {end.isTarget ? "fromReel" : "toReel", end.otherReel + 1},
+                {"frames", end.move.frames},
+                {"offsetFrames", entry.runningOffset}};
     }
 
     ordered_json keptJson(const NoteEntry& entry) const
@@ -244,8 +294,6 @@ private:
                 changes.back()["standsAt"] = placeJson(step.doubledFrom[doubled++]);
         }
         json["changes"] = std::move(changes);
-        if (const core::StepSound* const sound = m_words.soundOf(entry))
-            json["sound"] = SoundJson(*m_document.sound).ofStep(*sound);
         return json;
     }
 

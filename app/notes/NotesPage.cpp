@@ -6,10 +6,12 @@ namespace cadrel::app {
 
 const std::string_view NotesPage::Style = R"(
 :root { color-scheme: light dark; --paper: #fbfaf8; --ink: #1d1f22; --dim: #5f646b; --line: #dddad4; --card: #fff;
-  --kept: #7d93ad; --moved: #d38a1f; --lifted: #c8453b; --inserted: #2f9460; --doubled: #8a5bbf; --other: #3b78c4; }
+  --kept: #7d93ad; --moved: #d38a1f; --lifted: #c8453b; --inserted: #2f9460; --doubled: #8a5bbf; --version: #3b78c4;
+  --trimmed: #c7568f; --replaced: #16909f; --retimed: #8d7d12; --transition: #855a3f; --accent: #3b78c4; }
 @media screen and (prefers-color-scheme: dark) {
   :root { --paper: #17191c; --ink: #e4e5e7; --dim: #969ca5; --line: #33373d; --card: #1f2226;
-    --kept: #64799a; --moved: #e0a13f; --lifted: #e26a60; --inserted: #4db582; --doubled: #a983d8; --other: #6ba3e6; } }
+    --kept: #64799a; --moved: #e0a13f; --lifted: #e26a60; --inserted: #4db582; --doubled: #a983d8; --version: #6ba3e6;
+    --trimmed: #e57fb2; --replaced: #3fbdcc; --retimed: #bdab35; --transition: #bb8d6d; --accent: #6ba3e6; } }
 * { box-sizing: border-box; }
 body { margin: 0; padding: 28px; background: var(--paper); color: var(--ink); font: 15px/1.45 system-ui, sans-serif; }
 main { max-width: 1180px; margin: 0 auto; }
@@ -24,13 +26,17 @@ p { margin: 0 0 12px; overflow-wrap: anywhere; } .dim { color: var(--dim); }
 .strip .reels { position: relative; display: block; height: 15px; overflow: hidden; font-size: 11px; }
 .reels b { position: absolute; padding-left: 3px; font-weight: 500; }
 svg { display: block; width: 100%; height: 190px; margin: 4px 0; cursor: pointer; }
-svg:focus-visible, tr:focus-visible, button:focus-visible, summary:focus-visible { outline: 2px solid var(--other); outline-offset: 1px; }
+svg:focus-visible, tr:focus-visible, button:focus-visible, summary:focus-visible { outline: 2px solid var(--accent); outline-offset: 1px; }
 .base { fill: var(--line); } .reel { stroke: var(--ink); stroke-width: 1.5; vector-effect: non-scaling-stroke; }
-.kept { fill: var(--kept); fill-opacity: .34; } .seen { fill: var(--kept); }
-.moved { fill: var(--moved); fill-opacity: .62; } .doubled { fill: var(--doubled); fill-opacity: .62; }
-.lifted { fill: var(--lifted); } .inserted { fill: var(--inserted); } .version { fill: var(--other); }
-svg .on { fill-opacity: 1; stroke: var(--ink); stroke-width: 1; vector-effect: non-scaling-stroke; }
-svg [data-step]:hover { fill-opacity: .95; } svg .off { display: none; }
+.kept { --hue: var(--kept); } .trimmed { --hue: var(--trimmed); } .lifted { --hue: var(--lifted); }
+.inserted { --hue: var(--inserted); } .replaced { --hue: var(--replaced); } .moved { --hue: var(--moved); }
+.doubled { --hue: var(--doubled); } .retimed { --hue: var(--retimed); } .version { --hue: var(--version); }
+.transition { --hue: var(--transition); }
+svg [data-rows] { fill: var(--hue); }
+path.kept { fill-opacity: .34; stroke-opacity: .34; } path.moved, path.doubled { fill-opacity: .62; stroke-opacity: .62; }
+svg .thin { stroke: var(--hue); stroke-width: 1; vector-effect: non-scaling-stroke; }
+svg .on { fill-opacity: 1; stroke: var(--ink); stroke-opacity: 1; stroke-width: 1; vector-effect: non-scaling-stroke; }
+svg [data-rows]:hover { fill-opacity: .95; } svg .off { display: none; }
 .tools { display: flex; flex-wrap: wrap; gap: 6px 14px; align-items: center; margin: 14px 0 6px; font-size: 14px; }
 .tools label { display: inline-flex; gap: 5px; align-items: center; }
 .tools i { width: 11px; height: 11px; border-radius: 3px; background: var(--hue); }
@@ -39,19 +45,16 @@ svg [data-step]:hover { fill-opacity: .95; } svg .off { display: none; }
 .wide { overflow-x: auto; } table { width: 100%; border-collapse: collapse; margin-top: 10px; }
 .steps { table-layout: fixed; min-width: 780px; } .steps th:nth-child(1) { width: 52px; } .steps th:nth-child(2) { width: 108px; }
 .steps th:nth-child(3) { width: 300px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 118px; }
-.overview { width: auto; } .overview td, .overview th { padding: 2px 18px 2px 10px; } .overview a { color: inherit; }
+.overview { width: auto; } .overview td, .overview th { padding: 2px 18px 2px 10px; } .overview a, .steps a { color: inherit; }
 th { text-align: left; font-size: 13px; font-weight: 500; color: var(--dim); border-bottom: 1px solid var(--line);
   padding: 4px 10px; }
 td { padding: 6px 10px; border-bottom: 1px solid var(--line); vertical-align: top; }
 td.tc { font-size: 13.5px; } .num { text-align: right !important; }
 tr.k td { padding-top: 2px; padding-bottom: 2px; font-size: 12.5px; color: var(--dim); }
-tr.on td { background: color-mix(in srgb, var(--other) 16%, transparent); }
+tr.on td { background: color-mix(in srgb, var(--accent) 16%, transparent); }
 tbody tr[id] { scroll-margin-top: 20px; cursor: pointer; }
-.tag { --hue: var(--other); display: inline-block; font-size: 12px; padding: 0 7px; border-radius: 9px; margin-right: 7px;
+.tag { display: inline-block; font-size: 12px; padding: 0 7px; border-radius: 9px; margin-right: 7px;
   background: color-mix(in srgb, var(--hue) 26%, transparent); white-space: nowrap; }
-.tag.lifted, .tag.head-trimmed, .tag.tail-trimmed { --hue: var(--lifted); }
-.tag.plus, .tag.inserted { --hue: var(--inserted); } .tag.moved { --hue: var(--moved); }
-.tag.doubled { --hue: var(--doubled); }
 .tag.sound { --hue: var(--kept); }
 details.sound { margin: 3px 0 2px; font-size: 14px; } details.sound summary { cursor: pointer; }
 details.sound ul { margin: 3px 0 5px; padding-left: 20px; list-style: none; } details.sound small { color: var(--dim); }
@@ -72,7 +75,9 @@ ol.largest a { color: inherit; }
 const std::string_view NotesPage::Script = R"(
 const svg = document.querySelector('svg'), whole = svg.viewBox.baseVal.width;
 const rows = [...document.querySelectorAll('tr[id]')], steps = rows.filter(row => !row.classList.contains('k'));
-const marks = [...svg.querySelectorAll('[data-step]')];
+const marks = [...svg.querySelectorAll('[data-rows]')];
+const rowsOf = mark => mark.dataset.rows ? mark.dataset.rows.split(' ') : [];
+const marksOf = id => [...svg.querySelectorAll(`[data-rows~="${id}"]`)];
 const reelNumbers = [...document.querySelectorAll('.reels b')];
 let left = 0, width = whole, at = -1;
 function show() {
@@ -98,10 +103,10 @@ function choose(id, scrolls) {
   at = rows.indexOf(row);
   row.classList.add('on');
   if (scrolls) row.scrollIntoView({ block: 'center' });
-  document.querySelectorAll(`svg [data-step="${id}"]`).forEach(e => e.classList.add('on'));
+  marksOf(id).forEach(e => e.classList.add('on'));
 }
 function reveal(id) {
-  const mark = document.querySelector(`svg [data-step="${id}"]`);
+  const mark = marksOf(id)[0];
   if (!mark || width === whole) return;
   const box = mark.getBBox();
   if (box.x < left || box.x + box.width > left + width) { left = box.x + box.width / 2 - width / 2; show(); }
@@ -110,7 +115,10 @@ function step(way) {
   for (let i = at + way; i >= 0 && i < rows.length; i += way)
     if (!rows[i].hidden && !rows[i].classList.contains('k')) { choose(rows[i].id, true); reveal(rows[i].id); return; }
 }
-svg.addEventListener('click', e => { if (e.target.dataset.step) choose(e.target.dataset.step, true); });
+svg.addEventListener('click', e => {
+  const ids = rowsOf(e.target).filter(id => !document.getElementById(id).hidden);
+  if (ids.length) choose(ids[(ids.indexOf(rows[at]?.id) + 1) % ids.length], true);
+});
 svg.addEventListener('wheel', e => {
   if (!e.ctrlKey && !e.shiftKey) return;
   e.preventDefault();
@@ -130,9 +138,11 @@ document.addEventListener('keydown', e => {
 });
 const sounds = [...document.querySelectorAll('details.sound')];
 const unfold = all => sounds.forEach(sound => { sound.open = all; });
+let before = null;
 document.querySelectorAll('[data-sound]').forEach(b => b.addEventListener('click',
   () => unfold(sounds.some(sound => !sound.open))));
-addEventListener('beforeprint', () => unfold(true));
+addEventListener('beforeprint', () => { before ??= sounds.map(sound => sound.open); unfold(true); });
+addEventListener('afterprint', () => { before?.forEach((open, i) => { sounds[i].open = open; }); before = null; });
 const boxes = [...document.querySelectorAll('.tools input')];
 function filter() {
   const shown = new Set(boxes.filter(b => b.checked).map(b => b.value));
@@ -141,7 +151,7 @@ function filter() {
     row.hidden = !row.dataset.kinds.split(' ').some(kind => shown.has(kind));
     if (row.hidden) left.add(row.id);
   });
-  marks.forEach(mark => mark.classList.toggle('off', left.has(mark.dataset.step)));
+  marks.forEach(mark => mark.classList.toggle('off', left.has(rowsOf(mark)[0])));
   const note = document.querySelector('.left');
   note.hidden = left.size === 0;
   note.textContent = `Left out: ${boxes.filter(b => !b.checked).map(b => b.parentElement.innerText.trim()).join(', ')}. ` +
@@ -151,7 +161,7 @@ boxes.forEach(box => box.addEventListener('change', filter));
 show();
 document.querySelectorAll('[data-zoom]').forEach(b => b.addEventListener('click', () => zoom(+b.dataset.zoom)));
 document.querySelectorAll('a[href^="#s"]').forEach(a => a.addEventListener('click', e => {
-  e.preventDefault(); choose(a.hash.slice(1), true); reveal(a.hash.slice(1)); }));
+  e.preventDefault(); e.stopPropagation(); choose(a.hash.slice(1), true); reveal(a.hash.slice(1)); }));
 )";
 
 } // namespace cadrel::app

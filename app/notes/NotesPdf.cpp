@@ -31,6 +31,7 @@ constexpr double BandHeight = 84;
 constexpr double LineHeight = 10.5;
 /// A step with more lines goes on over the page.
 constexpr std::size_t MostLinesOfAPiece = 24;
+constexpr std::size_t MostCharactersOfATitle = 70;
 /// Of what stands above the rows of a reel that goes on from the page before.
 constexpr double ContinuedHeight = 30;
 
@@ -115,8 +116,12 @@ private:
     {
         const core::NoteTotals& totals = m_document.notes.totals();
         const auto time = [this](std::int32_t frames) { return m_words.timecode(frames); };
+        const std::string titles = titleOf(false) + " to " + titleOf(true);
+        m_pages.describe("Change notes: " + titles,
+                         toPrintable("Old cut " + m_words.cutName(false) + ", new cut " + m_words.cutName(true)).text);
         addText("Change notes", TitleFont, Ink, 22);
         add(6, [](PdfPages&, double) {});
+        addText(titles, HeadingFont, Ink, 18);
         addText("Old cut: " + m_words.cutText(false), BodyFont, Dim, 13);
         addText("New cut: " + m_words.cutText(true), BodyFont, Dim, 13);
         addText(concatenated({m_document.rate, ", ", time(totals.before), " before, ", time(totals.after), " after, ",
@@ -132,6 +137,16 @@ private:
         for (const std::string& line : m_words.settings())
             addText(line, BodyFont, Dim, 13);
         addText(std::string(NotesWording::Order), BodyFont, Ink, 13);
+    }
+
+    /// What the files of a cut call it, or their names where they don't; of many titles the first and the last.
+    std::string titleOf(bool isNew) const
+    {
+        const std::vector<std::string>& titles = isNew ? m_document.cuts.newTitles : m_document.cuts.oldTitles;
+        if (titles.empty())
+            return toPrintable(m_words.cutName(isNew)).text;
+        const std::string first = toPrintable(titles.front(), MostCharactersOfATitle).text;
+        return titles.size() == 1 ? first : first + " ... " + toPrintable(titles.back(), MostCharactersOfATitle).text;
     }
 
     double xOf(std::int32_t frame) const
@@ -227,6 +242,8 @@ private:
                          isMoved ? Moved : Band);
             return;
         }
+        if (entry.step() == nullptr)
+            return;
         const core::NoteStep& step = *entry.step();
         if (!drawsMoves || step.action == core::StepAction::Move)
             return;
@@ -306,7 +323,7 @@ private:
         m_pages.text(Margin + 92, y, "what to do, and what changes", SmallFont, Dim);
         m_pages.textToRight(m_lengthRight, y, "length", SmallFont, Dim);
         m_pages.textToRight(m_right, y, "offset", SmallFont, Dim);
-        m_pages.box(Margin, top + 15, m_right - Margin, 0.5, Rule);
+        m_pages.rule(Margin, top + 15, m_right - Margin, 0.5, Rule);
     }
 
     /// Above the rows of a reel that goes on from the page before.
@@ -319,7 +336,7 @@ private:
 
     void addRow(const NoteEntry& entry, std::size_t reel)
     {
-        if (entry.kept() != nullptr) {
+        if (entry.step() == nullptr) {
             add(10.5,
                 [this, &entry, reel](PdfPages&, double top) { drawTimes(entry, reel, top + 8, SmallTimeFont, Dim); });
             return;
@@ -337,7 +354,7 @@ private:
                     drawTimes(entry, reel, top + head, TimeFont, Ink);
                 const double bottom = drawLines(pages, piece, top + head);
                 if (foot > 0)
-                    pages.box(Margin, bottom + 4, m_right - Margin, 0.4, Rule);
+                    pages.rule(Margin, bottom + 4, m_right - Margin, 0.4, Rule);
             });
         }
     }

@@ -20,6 +20,7 @@ namespace {
 
 constexpr std::size_t Width = 80;
 constexpr std::size_t NumberWidth = 4;
+constexpr std::size_t TimeWidth = 13;
 constexpr std::size_t ActionWidth = 35;
 constexpr std::size_t WhatWidth = 33;
 constexpr std::size_t SoundWhatWidth = 21;
@@ -98,8 +99,9 @@ public:
         sink(reels());
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
             sink(concatenated({"\n", m_words.reelTitle(reel), "\n", m_words.reelLengths(reel), "\n\n"}));
-            sink(trimmedEnd(padded("step", Indent.size()) + padded("at", 13) + padded("what to do", ActionWidth + 1) +
-                            padded("      length", 13) + "      offset"));
+            sink(trimmedEnd(padded("step", Indent.size()) + padded("at", TimeWidth) +
+                            padded("what to do", ActionWidth + 1) + padded("      length", TimeWidth) +
+                            "      offset"));
             for (const NoteEntry& entry : m_document.notes.reels()[reel].entries)
                 sink(rowText(entry, reel));
         }
@@ -190,15 +192,19 @@ private:
 
     std::string rowText(const NoteEntry& entry, std::size_t reel) const
     {
-        const bool isKept = entry.kept() != nullptr;
+        const std::string number = entry.number == 0 ? "" : numberText(entry.number);
+        const std::string start =
+            padded(number, Indent.size()) +
+            padded(m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel))), TimeWidth);
+        // Only a step has a change of length, so that there is room for longer words in its place.
+        if (entry.step() == nullptr)
+            return trimmedEnd(start + padded(m_words.action(entry), ActionWidth + 1 + TimeWidth) +
+                              m_words.change(entry.runningOffset)) +
+                   moveText(entry);
         std::string text =
-            trimmedEnd(padded(isKept ? "" : numberText(entry.number), Indent.size()) +
-                       padded(m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel))), 13) +
-                       padded(m_words.action(entry), ActionWidth + 1) +
-                       padded(entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange), 13) +
+            trimmedEnd(start + padded(m_words.action(entry), ActionWidth + 1) +
+                       padded(entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange), TimeWidth) +
                        m_words.change(entry.runningOffset));
-        if (isKept)
-            return text;
         for (const PictureChange& change : entry.step()->changes) {
             const ChangeWords words = m_words.describe(change);
             text += trimmedEnd(Indent + padded(words.what, WhatWidth) + "  " + words.shot);
@@ -212,6 +218,12 @@ private:
         if (const core::StepSound* const sound = m_words.soundOf(entry))
             text += soundText(*sound);
         return text;
+    }
+
+    /// The shots at the other end of a move; empty for a kept stretch.
+    std::string moveText(const NoteEntry& entry) const
+    {
+        return entry.moveEnd() == nullptr ? "" : Indent + m_words.describe(entry.moveEnd()->move).shot + "\n";
     }
 
     std::string soundText(const core::StepSound& sound) const

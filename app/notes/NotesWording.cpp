@@ -39,12 +39,13 @@ constexpr std::size_t MostFilesNamed = 3;
 /// So many events with the same doubt are named, and so many lines that were not read.
 constexpr std::size_t MostOfAKind = 5;
 
-constexpr std::array<std::string_view, 12> KindWords{
+constexpr std::array<std::string_view, 13> KindWords{
     "head-trimmed", "tail-trimmed", "lifted",          "inserted",         "replaced",           "moved",
-    "doubled",      "retimed",      "version-changed", "transition-added", "transition-removed", "transition-changed"};
+    "doubled",      "retimed",      "version-changed", "transition-added", "transition-removed", "transition-changed",
+    "unchanged"};
 constexpr std::array<std::string_view, 3> ActionWords{"replace", "move", "relabel"};
 constexpr std::array<std::string_view, 5> DoubtWords{"no-picture", "flawed", "reversed", "nameless", "covered"};
-static_assert(static_cast<std::size_t>(ChangeKind::TransitionChanged) + 1 == KindWords.size());
+static_assert(static_cast<std::size_t>(ChangeKind::Unchanged) + 1 == KindWords.size());
 static_assert(static_cast<std::size_t>(StepAction::Relabel) + 1 == ActionWords.size());
 static_assert(static_cast<std::size_t>(PictureDoubt::Covered) + 1 == DoubtWords.size());
 
@@ -57,6 +58,15 @@ std::string signedFrames(std::int32_t frames)
 std::string percent(double speed)
 {
     return std::to_string(std::lround(speed * 100));
+}
+
+/// A name and how many more there are: "42A-3 MAREN MCU and 2 more".
+std::string withMore(const std::string& name, std::size_t more)
+{
+    if (more == 0)
+        return name;
+    const std::string text = concatenated({" and ", std::to_string(more), " more"});
+    return toPrintable(name, MostCharactersOfAName - text.size()).text + text;
 }
 
 std::string_view explanationOf(PictureDoubt doubt)
@@ -130,6 +140,8 @@ WorkPlace NotesWording::placeOf(const NoteEntry& entry, std::size_t reel) const
     if (const core::KeptStretch* const kept = entry.kept())
         return {reel,
                 kept->newStart - m_document.notes.newCut().reels()[*m_document.notes.reels()[reel].pair.newReel].start};
+    if (const core::MoveEnd* const end = entry.moveEnd())
+        return end->place;
     const NoteStep& step = *entry.step();
     const bool goesFurtherOn =
         step.action == StepAction::Move &&
@@ -141,6 +153,9 @@ std::string NotesWording::action(const NoteEntry& entry) const
 {
     if (const core::KeptStretch* const kept = entry.kept())
         return "kept " + timecode(kept->length) + ", was " + timecode(m_document.notes.oldTimecode(kept->oldStart));
+    if (const core::MoveEnd* const end = entry.moveEnd())
+        return concatenated({"moved ", timecode(end->move.frames), end->isTarget ? " from reel " : " to reel ",
+                             std::to_string(end->otherReel + 1), ", step ", std::to_string(end->step)});
     const NoteStep& step = *entry.step();
     switch (step.action) {
     case StepAction::Move: {
@@ -168,9 +183,11 @@ std::string NotesWording::action(const NoteEntry& entry) const
 const PictureChange& NotesWording::largestChange(const NoteEntry& entry)
 {
     const auto& changes = entry.step()->changes;
-    return *std::max_element(changes.begin(), changes.end(), [](const PictureChange& a, const PictureChange& b) {
-        return std::abs(a.frames) < std::abs(b.frames);
-    });
+    const auto extentOf = [](const PictureChange& change) {
+        return change.kind == ChangeKind::Unchanged ? 0 : std::abs(change.frames);
+    };
+    return *std::max_element(changes.begin(), changes.end(),
+                             [&](const PictureChange& a, const PictureChange& b) { return extentOf(a) < extentOf(b); });
 }
 
 std::string NotesWording::inFeet(const NoteEntry& entry) const
@@ -251,11 +268,11 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
         return {"replaced " + length, name,
                 concatenated({materialOf(change), change.newShot == nullptr ? "" : ", ", "was ", nameOf(change.oldShot),
                               oldPlace()})};
-    case ChangeKind::Moved: {
-        const std::string more =
-            change.shots > 1 ? concatenated({" and ", std::to_string(change.shots - 1), " more"}) : "";
-        return {"moved " + length + oldPlace(), toPrintable(name, MostCharactersOfAName - more.size()).text + more, {}};
-    }
+    case ChangeKind::Moved:
+        return {"moved " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)),
+                "in the old cut" + oldPlace()};
+    case ChangeKind::Unchanged:
+        return {"unchanged " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)), {}};
     case ChangeKind::Doubled:
         return {"once more " + length, name, "stood once in the old cut" + oldPlace()};
     case ChangeKind::Retimed:
@@ -303,7 +320,7 @@ std::string NotesWording::reelLengths(std::size_t reel) const
 {
     const core::ReelNotes& notes = m_document.notes.reels()[reel];
     if (notes.before == notes.after)
-        return timecode(notes.before) + " before and after" + (stepsOf(reel) == 0 ? ", nothing has changed" : "");
+        return timecode(notes.before) + " before and after" + (notes.isUnchanged() ? ", nothing has changed" : "");
     return timecode(notes.before) + " before, " + timecode(notes.after) + " after, " +
            change(notes.after - notes.before);
 }
@@ -317,12 +334,7 @@ std::size_t NotesWording::stepsOf(std::size_t reel) const
 
 std::string NotesWording::shotsOf(const NoteEntry& entry) const
 {
-    const std::size_t more = entry.step()->changes.size() - 1;
-    const std::string shot = describe(largestChange(entry)).shot;
-    if (more == 0)
-        return shot;
-    const std::string text = concatenated({" and ", std::to_string(more), " more"});
-    return toPrintable(shot, MostCharactersOfAName - text.size()).text + text;
+    return withMore(describe(largestChange(entry)).shot, entry.step()->changes.size() - 1);
 }
 
 std::string NotesWording::cutName(bool isNew) const
@@ -347,6 +359,10 @@ std::vector<std::string> NotesWording::remarks() const
         lines.push_back(std::to_string(joined) + " trims that cancel out within " +
                         counted(static_cast<std::size_t>(m_document.layout.simplify), "frame") + " are joined");
     for (const bool isNew : {false, true}) {
+        for (const std::string& file : isNew ? m_document.cuts.newOverlapping : m_document.cuts.oldOverlapping)
+            lines.push_back(toPrintable(file, MostCharactersOfAName).text +
+                            " lies on the same timecode as another file of its cut: of what stands on top of each "
+                            "other, the one that starts later is seen");
         addDoubts(isNew, lines);
         addUnread(isNew, lines);
     }

@@ -49,12 +49,12 @@ public:
 
     /// Where a row stands in the programme as it is then. Of a move to further on it is where the picture is taken from.
     core::WorkPlace placeOf(const core::NoteEntry& entry, std::size_t reel) const;
-    /// "delete 00:00:01:00".
+    /// "delete 00:00:01:00"; at the other end of a move "moved 00:00:30:00 to reel 8, step 40".
     std::string action(const core::NoteEntry& entry) const;
     ChangeWords describe(const core::PictureChange& change) const;
     /// The change of a step that stands for it where there is room for one.
     static const core::PictureChange& largestChange(const core::NoteEntry& entry);
-    /// Feet and frames of the row, counted inclusively: "at 12+05 delete through 13+04"; empty for a kept stretch.
+    /// Feet and frames of the row, counted inclusively: "at 12+05 delete through 13+04"; empty for a row that is no step.
     std::string inFeet(const core::NoteEntry& entry) const;
     /// "Reel 1, 03:00:00:00".
     std::string reelTitle(std::size_t reel) const;

@@ -137,8 +137,8 @@ std::vector<SoundLine> SoundWording::lines(const StepSound& sound) const
     for (const AutomationJump& jump : sound.jumps) {
         if (lines.size() == MostLines)
             return lines;
-        lines.push_back(
-            {"automation jumps", timecode(jump.place.start), toPrintable(jump.where, 2 * MostCharactersOfAClip).text});
+        lines.push_back({"automation jumps", timecode(jump.place.start),
+                         toPrintable(joined(jump.tracks), 2 * MostCharactersOfAClip).text});
     }
     return lines;
 }

@@ -127,9 +127,11 @@ struct AttributeKey {
     static constexpr const char* LockState = "Cadrel:LockState";
     /// On a track that a preview shows or that has something left of a run: an IAttributeData with numbers.
     static constexpr const char* Preview = "Cadrel:Preview";
+    /// On such a track, beside it: an IAttributeData with numbers of each event.
+    static constexpr const char* PreviewEvents = "Cadrel:PreviewEvents";
     /// On the project while a preview has room past its end: an IAttributeData with numbers.
     static constexpr const char* ProjectEnd = "Cadrel:ProjectEnd";
-    /// In both lists: the numbers.
+    /// In these lists: the numbers.
     static constexpr const char* Numbers = "Numbers";
     /// On a marker, a video and a folder track: the role of the track, an integer.
     static constexpr const char* MarkerType = "Cadrel:MarkerType";
@@ -137,6 +139,8 @@ struct AttributeKey {
     static constexpr const char* FolderType = "Cadrel:FolderType";
     /// On a marker: an integer by which the marker is known in the source and in the preview stretch.
     static constexpr const char* EventUserId = "CadrEventUserId";
+    /// On a copy of a memo in the preview stretch: a number made of what it was like when its memo followed it last.
+    static constexpr const char* Followed = "Cadrel:Followed";
     /// On a marker: the reel of the change event, a text.
     static constexpr const char* Reel = "User:STR_MAReel";
 };

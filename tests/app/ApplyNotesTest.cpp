@@ -163,6 +163,15 @@ TEST(ApplyNotes, TheCsvHasColumnsForTheSound)
     EXPECT_EQ(std::count(csv.begin(), csv.end(), '\n'), 3);
 }
 
+TEST(ApplyNotes, NoNameOfTheSoundIsAFormulaInTheCsv)
+{
+    const Sound sound("@DIA", "=1+1", {track("marker", "Scenes", range("+2", 3600, 3630))});
+
+    const std::string csv = sound.notes(".csv");
+
+    EXPECT_TRUE(tells(csv, ",'+2,0,1,0,1,0,0,'@DIA,0,\"'@DIA: =1+1 at 01:00:08:00: split, -00:00:02:00; ")) << csv;
+}
+
 TEST(ApplyNotes, TheJsonHasTheTimesOfEachChange)
 {
     const Sound sound;
@@ -180,6 +189,17 @@ TEST(ApplyNotes, TheJsonHasTheTimesOfEachChange)
         "lost": {"in": {"seconds": 3610.0, "timecode": "01:00:10:00"},
                  "out": {"seconds": 3612.0, "timecode": "01:00:12:00"}}})"));
     EXPECT_EQ(step.at("changes")[1].at("kind"), "fell-out");
+}
+
+TEST(ApplyNotes, QuotesAndOtherScriptsInNamesAreWholeInTheJson)
+{
+    const std::string name = "\"key\" \\ \t Größe 海";
+    const Sound sound("DIA \"1\"", name);
+
+    const json change = stepOf(sound.notesAsJson(), 1).at("sound").at("changes")[0];
+
+    EXPECT_EQ(change.at("name"), name);
+    EXPECT_EQ(change.at("trackName"), "DIA \"1\"");
 }
 
 TEST(ApplyNotes, TellTheSettingsOfTheRun)

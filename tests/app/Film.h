@@ -47,7 +47,7 @@ inline std::string newCut()
 /// The timecode so many seconds after 01:00:00:00.
 inline std::string secondsOn(int seconds)
 {
-    std::array<char, 16> text{};
+    std::array<char, 40> text{};
     std::snprintf(text.data(), text.size(), "%02d:%02d:%02d:00", 1 + seconds / 3600, seconds / 60 % 60, seconds % 60);
     return text.data();
 }

@@ -333,6 +333,25 @@ TEST(Keep, ACurveThatGoesOnBeyondTheChangeHasNoStrayPoints)
     }
 }
 
+TEST(Keep, TellsOfSoundThatWouldStandBeforeTheProjectBegins)
+{
+    const Reel earlier = Reel(Hour - 4).shot("A", 100, 10).shot("B", 200, 10).shot("C", 300, 10);
+    // So many seconds after the time origin.
+    const auto sound = [](double start) {
+        return json::array({audioTrack("DIA", {clip("a", start, start + 10), clip("b", start + 10, start + 20)})});
+    };
+
+    const Outcome cut = Job(threeShots(), earlier, sound(0), Hour).run();
+    EXPECT_EQ(cut.status, 0) << cut.err;
+    EXPECT_TRUE(
+        tells(cut.err, "Material of event 1 would stand before the project or its day begins. It has been left out."))
+        << cut.err;
+
+    const Outcome whole = Job(threeShots(), earlier, sound(4), Hour - 4).run();
+    EXPECT_EQ(whole.status, 0) << whole.err;
+    EXPECT_FALSE(tells(whole.err, "left out")) << whole.err;
+}
+
 TEST(Keep, InRandomProjectsOneChangeLeavesWhatIsBeforeItAndShiftsWhatIsAfter)
 {
     constexpr double Change = 40;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/Film.h"
+#include "tests/app/NotesOfCuts.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/support/TreePaths.h"
 
@@ -33,39 +34,6 @@ std::ptrdiff_t columnsOf(const std::string& text)
                          [](char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U; });
 }
 
-/// An old and a new cut in a folder of their own.
-class Cuts {
-public:
-    Cuts(const std::string& oldText, const std::string& newText)
-        : m_old(folder.write("old.edl", oldText)), m_new(folder.write("new.edl", newText))
-    {
-    }
-
-    Outcome notes(const std::vector<std::string>& more = {}) const
-    {
-        std::vector<std::string> arguments{"notes", "--old", m_old, "--new", m_new};
-        arguments.insert(arguments.end(), more.begin(), more.end());
-        return runCadrel(arguments);
-    }
-
-    /// The notes in the form of that extension.
-    std::string file(const std::string& extension, std::vector<std::string> more = {}) const
-    {
-        const std::string path = folder / ("notes" + extension);
-        more.insert(more.end(), {"-o", path});
-        const Outcome outcome = notes(more);
-        EXPECT_EQ(outcome.status, 0) << outcome.err;
-        EXPECT_EQ(outcome.out, "");
-        return contentOf(path);
-    }
-
-    const TempFolder folder;
-
-private:
-    const std::string m_old;
-    const std::string m_new;
-};
-
 std::vector<std::string> reel3(std::vector<std::string> more)
 {
     std::vector<std::string> arguments{"notes",
@@ -86,23 +54,6 @@ json reel3Json()
     const Outcome outcome = runCadrel(reel3({"-o", path}));
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     return json::parse(contentOf(path));
-}
-
-/// A text with a single blank wherever there are blanks or line ends.
-std::string unbroken(const std::string& text)
-{
-    std::istringstream stream(text);
-    std::string all;
-    for (std::string word; stream >> word;)
-        all.append(all.empty() ? "" : " ").append(word);
-    return all;
-}
-
-std::string textOfPdf(const std::string& file)
-{
-    const Outcome outcome = runProgram("pdftotext", {"-layout", file, "-"});
-    EXPECT_EQ(outcome.status, 0) << outcome.err;
-    return outcome.out;
 }
 
 TEST(Notes, ShowsTheStepsAsText)
@@ -305,7 +256,7 @@ TEST(Notes, TheFiguresOfTheExampleAreThoseOfItsListOfChanges)
     std::vector<std::string> versions;
     int change = 0;
     for (const json& row : notes.at("reels")[0].at("rows")) {
-        if (row.at("row") == "kept")
+        if (row.at("row") != "step")
             continue;
         change += row.at("lengthChangeFrames").get<int>();
         moves += row.at("action") == "move" ? 1 : 0;
@@ -422,7 +373,7 @@ TEST(Notes, APartOfAShotTellsTheSourceOfThePart)
     EXPECT_EQ(text.find("source 00:00:41:16"), std::string::npos) << text;
     std::vector<std::string> sources;
     for (const json& row : notes.at("reels")[0].at("rows")) {
-        if (row.at("row") == "kept")
+        if (row.at("row") != "step")
             continue;
         for (const json& change : row.at("changes")) {
             if (change.contains("sourceIn"))
@@ -542,6 +493,34 @@ TEST(Notes, WhatIsHealedDoubtedAndNotReadStandsInEveryForm)
         EXPECT_LE(columnsOf(line), 80) << line;
 }
 
+TEST(Notes, TwoFilesOnOneTimecodeAreARemarkInEveryForm)
+{
+    const TempFolder folder;
+    const std::string first = folder.write("r1.edl", oldCut());
+    const std::string beside =
+        folder.write("r2.edl", cut("001", "B001", "10:00:00:00 10:00:10:12", "01:00:30:00 01:00:40:12"));
+    // A frame on top of the last shot.
+    const std::string onTop =
+        folder.write("r3.edl", cut("001", "C001", "10:00:00:00 10:00:10:12", "01:00:29:23 01:00:30:00"));
+    const auto notes = [&](const std::string& form, const std::vector<std::string>& more) {
+        const std::string file = folder / ("notes" + form);
+        std::vector<std::string> arguments{"notes",       "--new",  first,    "-o",    file,
+                                           "--overwrite", "--rate", "24 fps", "--old", first};
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        EXPECT_EQ(runCadrel(arguments).status, 0);
+        return form == ".pdf" ? textOfPdf(file) : contentOf(file);
+    };
+    const std::string remark = "r3.edl lies on the same timecode as another file of its cut";
+
+    for (const char* const form : {".txt", ".html", ".pdf"}) {
+        EXPECT_NE(unbroken(notes(form, {beside, onTop})).find(remark), std::string::npos) << form;
+        EXPECT_EQ(unbroken(notes(form, {beside})).find("lies on the same timecode"), std::string::npos) << form;
+    }
+    const json cuts = json::parse(notes(".json", {beside, onTop}));
+    EXPECT_EQ(cuts.at("old").at("overlappingFiles"), json({"r3.edl"}));
+    EXPECT_EQ(cuts.at("new").at("overlappingFiles"), json::array());
+}
+
 TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
 {
     // 20 s of new picture come first, so that the last shot is at 00:00:10:00 when it is to be moved.
@@ -568,9 +547,27 @@ TEST(Notes, PictureThatGoesToALaterReelIsToldWhereItGoes)
 
     const Outcome outcome = film.notes();
 
-    EXPECT_NE(outcome.out.find("   1  01:00:20:00  move 00:00:10:00 to 02:00:00:00     -00:00:10:00 -00:00:10:00\n"),
+    EXPECT_NE(outcome.out.find("   1  01:00:20:00  move 00:00:10:00 to 02:00:00:00     -00:00:10:00 -00:00:10:00\n"
+                               "      moved 00:00:10:00                  A002\n"
+                               "        in the old cut at 01:00:20:00\n"),
               std::string::npos)
         << outcome.out;
+    // The later reel tells of it without a number.
+    EXPECT_NE(outcome.out.find("      02:00:00:00  moved 00:00:10:00 from reel 1, step 1            +00:00:10:00\n"
+                               "      A002\n"
+                               "      02:00:00:00  kept 00:00:10:00, was 01:00:20:00                +00:00:10:00\n"),
+              std::string::npos)
+        << outcome.out;
+    film.file(".pdf");
+    EXPECT_NE(unbroken(textOfPdf(film.folder / "notes.pdf"))
+                  .find("02:00:00:00 moved 00:00:10:00 from reel 1, step 1 +00:00:10:00"),
+              std::string::npos);
+    const json told = json::parse(film.file(".json")).at("reels")[1].at("rows")[0];
+    EXPECT_EQ(told, json::parse(R"({"row": "moved", "step": 1, "fromReel": 1, "frames": 240, "offsetFrames": 240,
+                                    "at": {"reel": 2, "timecode": "02:00:00:00", "frame": 0}})"));
+    // The CSV has a row a step.
+    const std::string csv = film.file(".csv");
+    EXPECT_EQ(std::count(csv.begin(), csv.end(), '\n'), 2);
 }
 
 TEST(Notes, ACutHasNothingToTellOfItself)

@@ -4,6 +4,7 @@
 
 #include "host/Host.h"
 #include "host/border/HostFailure.h"
+#include "host/border/NumberList.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
 #include "standin/project/ClipEvent.h"
@@ -20,6 +21,7 @@
 #include <algorithm>
 #include <functional>
 #include <initializer_list>
+#include <limits>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -36,10 +38,11 @@ using util::Result;
 class HostPreviewStretchTest : public PreviewedFilm {
 protected:
     double previewOffset() { return adapter().getRunState().previewOffset; }
-    void reopen()
+    void reopen(const std::function<void()>& meanwhile = [] {})
     {
         host.project.announceStoring();
         host.disconnect();
+        meanwhile();
         host.connect();
     }
     /// Makes a run or preview fail once it has copied something, and lets it happen.
@@ -71,6 +74,12 @@ protected:
     void rename(const Node& event, const char16_t* name)
     {
         host.edit(u"Rename", [&] { event->setName(nullptr, standin::tests::text(name).get(), 0); });
+    }
+
+    /// To a time of the preview.
+    void moveTo(const Node& event, double time)
+    {
+        host.edit(u"Move", [&] { requireOk(event->setStart(nullptr, 0, Day + host.inHost(time))); });
     }
 
     const Texts film{"one 0-10", "two 10-20"};
@@ -147,6 +156,26 @@ TEST_P(HostPreviewStretchTest, LeavesACopyThatTheUserHasRenamedAndOneThatPlaysFr
 
     EXPECT_EQ(host.contentOf(track),
               (Texts{"one 0-10", "two 10-20", "two, the better take 86400-86410", "one 86410-86420"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesACopyThatTheUserHasGivenAnotherClipAndAPartThatHeHasEdited)
+{
+    const Node part = host.addPart(track, u"reel", host.inHost(0.0), host.inHost(10.0));
+    host.addClip(part, u"take", host.inHost(2.0), host.inHost(4.0));
+    previewAll();
+    const std::vector<Node> copies = standin::tests::childrenOf(*track);
+    ASSERT_EQ(host.contentOf(track),
+              (Texts{"one 0-10", "reel 0-10", "two 10-20", "two 86400-86410", "one 86410-86420", "reel 86410-86420"}));
+    auto& take = host.addMedia(u"/sound/better take.wav", 60.0);
+    host.edit(u"Replace", [&] {
+        dynamic_cast<standin::ClipEvent&>(*copies[3]).setClip(Counted<standin::MediaClip>::share(&take));
+    });
+    host.addClip(copies[5], u"added", Day + host.inHost(15.0), Day + host.inHost(16.0));
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track),
+              (Texts{"one 0-10", "reel 0-10", "two 10-20", "two 86400-86410", "reel 86410-86420"}));
 }
 
 TEST_P(HostPreviewStretchTest, LeavesOtherTracksAsTheyAre)
@@ -399,6 +428,45 @@ TEST_P(HostPreviewStretchTest, TakesAwayNothingForAnAttributeThatMakesNoSense)
     }
 }
 
+TEST_P(HostPreviewStretchTest, TakesAwayNothingOfTheFilmForARecordThatIsDamaged)
+{
+    const Node other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"shot", 12.0, 13.0);
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    host.addPoint(other, volume, host.inHost(3.0), 0.25F);
+    host.addPoint(other, volume, host.inHost(15.0), 0.75F);
+    const auto contents = [&] {
+        Texts all = host.contentOf(track);
+        for (const std::string& event : host.contentOf(other))
+            all.push_back(event);
+        for (const Node& point : standin::tests::childrenOf(*host.curveOf(other, volume)))
+            all.push_back(std::to_string(point->getStart(nullptr)));
+        return all;
+    };
+    const Texts before = contents();
+    using Numbers = std::vector<double>;
+    const double shot = host.inHost(12.0);
+    for (const Numbers& numbers :
+         {Numbers{0.0}, Numbers{-5.0, 1e9}, Numbers{0.0, 1.0, 25.0, 0.0, 1e9, shot, shot + 1.0, 0.0, 7.0},
+          Numbers{Day, 1e9}, Numbers{Day, 1.0, 25.0, 0.0, Day + 20.0, shot, shot + 1.0, 0.0, 7.0},
+          Numbers{0.001, 2.0, 25.0, 0.0, Day, 0.0, 7.0}, Numbers{std::numeric_limits<double>::quiet_NaN()},
+          Numbers{0.001, std::numeric_limits<double>::infinity()}}) {
+        SCOPED_TRACE(testing::PrintToString(numbers));
+        previewAll();
+        writeNumbers(host.context(), *other, AttributeKey::Preview, numbers);
+
+        adapter().setPreviewActive(false);
+
+        Texts after = contents();
+        // Copies on this track may stay.
+        std::erase_if(after, [&](const std::string& text) { return text.find(" 864") != std::string::npos; });
+        after.resize(std::min(after.size(), before.size()));
+        EXPECT_EQ(after, before);
+        while (contents() != before)
+            ASSERT_TRUE(host.undo());
+    }
+}
+
 // Memos.
 
 TEST_P(HostPreviewStretchTest, LeavesAMemoThatTheUserHasWrittenWhereTheNewCutHasNothing)
@@ -540,6 +608,148 @@ TEST_P(HostPreviewStretchTest, LeavesACopyThatIsMovedWhenNothingFollowsItAnyMore
     EXPECT_EQ(host.contentOf(memos), (Texts{"click 6-6", "click 86417-86417"}));
 }
 
+// What is edited where nobody follows.
+
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasMadeOfCopiesWhileTheSystemWasNotThere)
+{
+    addMemos({{u"click", 6.0}, {u"pop", 7.0}, {u"hiss", 8.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    reopen([&] {
+        const std::vector<Node> all = standin::tests::childrenOf(*memos);
+        moveTo(all[3], 11.0);
+        rename(all[4], u"pop is too loud");
+        FVariant id;
+        requireOk(all[2]->getAttribute(AttributeKey::EventUserId, id));
+        const Node pasted = host.addPointMarker(memos, u"pasted", Day + host.inHost(12.0));
+        requireOk(pasted->setAttribute(AttributeKey::EventUserId, id, true));
+    });
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop 7-7", "hiss 8-8", "click 86411-86411",
+                                            "pasted 86412-86412", "pop is too loud 86417-86417"}));
+}
+
+TEST_P(HostPreviewStretchTest, FollowsWhatTheUserHasMadeOfCopiesMeanwhileOnceAnotherMemoIsEdited)
+{
+    addMemos({{u"click", 6.0}, {u"pop", 7.0}, {u"hiss", 8.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    moveTo(standin::tests::childrenOf(*memos)[5], 19.0);
+    ASSERT_EQ(host.contentOf(memos)[2], "hiss 9-9");
+    moveTo(standin::tests::childrenOf(*memos)[2], 8.5 - Day);
+    reopen([&] { moveTo(standin::tests::childrenOf(*memos)[3], 11.0); });
+
+    rename(standin::tests::childrenOf(*memos)[4], u"pop is too loud");
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 1-1", "pop is too loud 7-7", "hiss 8.5-8.5", "click 86411-86411",
+                                            "pop is too loud 86417-86417", "hiss 86419-86419"}))
+        << "The last one was followed before, and its memo edited since.";
+
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 1-1", "pop is too loud 7-7", "hiss 8.5-8.5"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesTheMemoOfACopyThatWasRemovedWhileTheSystemWasNotThere)
+{
+    addMemos({{u"click", 6.0}, {u"pop", 7.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    reopen([&] {
+        const Node click = standin::tests::childrenOf(*memos)[2];
+        host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), click.get())); });
+    });
+
+    rename(standin::tests::childrenOf(*memos)[2], u"pop is too loud");
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop is too loud 7-7", "pop is too loud 86417-86417"}));
+}
+
+TEST_P(HostPreviewStretchTest, FollowsNothingOfAMemoWhoseTrackWasAwayForAWhile)
+{
+    addMemos({{u"click", 6.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    host.addPointMarker(memos, u"written meanwhile", host.inHost(3.0));
+    host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), memos.get())); });
+    ASSERT_TRUE(host.undo());
+
+    rename(standin::tests::childrenOf(*memos)[2], u"tick");
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"written meanwhile 3-3", "tick 6-6", "tick 86416-86416"}));
+}
+
+TEST_P(HostPreviewStretchTest, TakesCopiesAwayThatWereFollowedPastTheMaterialAndOverItsEnd)
+{
+    addMemos({{u"click", 6.0}});
+    const Node hiss = host.addRangeMarker(memos, u"hiss", host.inHost(2.0), host.inHost(4.0));
+    changes().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:10:00", "01:00:15:00");
+    host.carryOver("01:00:30:00", "01:00:40:00", "01:00:20:00", "01:00:30:00");
+    previewAll();
+    host.addPointMarker(memos, u"needs sound", Day + host.inHost(24.0));
+    const Node copy = standin::tests::childrenOf(*memos)[3];
+    host.edit(u"Trim", [&] { requireOk(copy->setEnd(nullptr, 0, Day + host.inHost(17.0))); });
+    const Texts expected{"hiss 2-5", "click 6-6", "needs sound 34-34"};
+    Texts all = expected;
+    all.insert(all.end(), {"hiss 86412-86417", "needs sound 86424-86424"});
+    ASSERT_EQ(host.contentOf(memos), all);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos), expected);
+}
+
+TEST_P(HostPreviewStretchTest, LetsMemosFollowEventsWhoseTimecodesAreFramesUnderThatRateAlone)
+{
+    addMemos({{u"click", 6.0}});
+    changes().clear();
+    host.carryOver("01:00:00:00", "01:00:09:24", "01:00:10:00", "01:00:19:24");
+    previewAll();
+    host.project.setFrameRate({24.0, 0});
+    host.idle();
+    for (const bool isReopened : {false, true}) {
+        SCOPED_TRACE(isReopened);
+        if (isReopened)
+            reopen();
+        const Node click = standin::tests::childrenOf(*memos)[1];
+
+        moveTo(click, 17.0);
+        EXPECT_EQ(host.contentOf(memos), (Texts{"click 7-7", "click 86417-86417"}));
+        moveTo(click, 11.0);
+        EXPECT_EQ(host.contentOf(memos), (Texts{"click 1-1", "click 86411-86411"}));
+    }
+}
+
+TEST_P(HostPreviewStretchTest, LetsMemosFollowBesideAnEventWhoseTimecodesAreNoFramesUnderThatRate)
+{
+    addMemos({{u"click", 6.0}});
+    host.project.setFrameRate({24.0, 0});
+    host.idle();
+    changes().clear();
+    host.carryOver("01:00:00:00", "01:00:09:00", "01:00:10:00", "01:00:19:00");
+    host.carryOver("01:00:20:00", "01:00:29:24", "01:00:30:00", "01:00:39:24");
+    previewAll();
+    host.project.setFrameRate({25.0, 0});
+    host.idle();
+    for (const bool isReopened : {false, true}) {
+        SCOPED_TRACE(isReopened);
+        if (isReopened)
+            reopen();
+        const Node click = standin::tests::childrenOf(*memos)[1];
+
+        moveTo(click, 17.0);
+        EXPECT_EQ(host.contentOf(memos), (Texts{"click 7-7", "click 86417-86417"}));
+        moveTo(click, 11.0);
+        EXPECT_EQ(host.contentOf(memos), (Texts{"click 1-1", "click 86411-86411"}));
+    }
+}
+
 // The begin of the clock.
 
 class HostPreviewAtTheBeginOfTheClock : public AtEachOrigin {};
@@ -612,6 +822,49 @@ TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheBeginOfTheHostsTim
     EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
     EXPECT_EQ(host.contentOf(track), Texts{"one 0-6"});
     EXPECT_EQ(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), 4.0);
+}
+
+// A second of a clip that hangs over would stand before 00:00:00:00. The last seconds of the day before the preview stretch
+// are the user's.
+TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheDayWhereTheProjectBeginsEarlier)
+{
+    constexpr double Origin = -10.0;
+    AdaptedHost host(Origin);
+    const Node track = host.addTrack(TypeWord::Audio, u"DX");
+    const auto addSound = [&](const char16_t* name, double start, double end) {
+        host.addClip(track, name, start - Origin, end - Origin);
+    };
+    const auto content = [&] {
+        std::vector<Span> spans;
+        for (const Node& child : standin::tests::childrenOf(*track))
+            spans.emplace_back(child->getStart(nullptr) + Origin, child->getEnd(nullptr) + Origin);
+        return spans;
+    };
+    using Spans = std::vector<Span>;
+    addSound(u"leader", -8.0, -3.0);
+    addSound(u"one", 90.0, 105.0);
+    addSound(u"late", Day - 4.0, Day - 0.5);
+    const Spans film = content();
+    const bool isRestricted = GetParam() == 0.0;
+    host.switchMarkersOff();
+    host.settings().setIncludeOverhangingAudioEvents(true);
+    host.settings().setRestrictRange(isRestricted);
+    host.settings().setPreserveMaterial(Origin, 300.0);
+    host.carryOver("00:01:31:00", "00:01:45:00", "00:00:00:00", "00:00:14:00");
+
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(content(), (Spans{{-8.0, -3.0}, {90.0, 105.0}, {Day - 4.0, Day - 0.5}, {Day, Day + 14.0}}));
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(content(), film);
+    EXPECT_EQ(host.alerts->messages.size(), 1U) << "The second is left out.";
+
+    host.conform();
+    Spans conformed{{-8.0, -3.0}, {0.0, 14.0}};
+    if (isRestricted)
+        conformed.emplace_back(Day - 4.0, Day - 0.5);
+    EXPECT_EQ(content(), conformed);
+    EXPECT_EQ(host.alerts->messages.size(), 2U);
 }
 
 // Locks.

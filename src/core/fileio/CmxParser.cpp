@@ -28,6 +28,7 @@ namespace {
 
 constexpr std::string_view ClipNameKey = "NAME:";
 constexpr std::string_view ByteOrderMark = "\xEF\xBB\xBF";
+constexpr std::string_view TitleWord = "TITLE:";
 constexpr std::size_t DstIn = 2; ///< of the four timecodes of a line
 
 bool isDigit(char character)
@@ -199,6 +200,8 @@ try {
             }
             return;
         }
+        if (m_remarks.title.empty() && line.starts_with(TitleWord))
+            m_remarks.title = StringUtil::trimView(line.substr(TitleWord.size()));
         const auto lookedAs = kind == LineKind::Comment ? UnreadLines::Kind::Comment : UnreadLines::Kind::Other;
         if (unread.lookAt(line, lineNumber, lookedAs) && m_isThorough)
             collector.passOver();

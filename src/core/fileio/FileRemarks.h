@@ -22,6 +22,7 @@ struct UnreadLine {
 
 /// What a file says besides its events.
 struct FileRemarks {
+    std::string title;                       ///< of its first TITLE line, in the bytes of the file; empty without one
     std::vector<UnreadLine> unreadLines;     ///< in the order of the file
     std::int32_t dropFrame = -1;             ///< -1 it says nothing, 0 non-drop, 1 drop-frame
     std::optional<SourceLine> dropFrameLine; ///< where it says so

@@ -5,10 +5,12 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/HealedEvent.h"
 #include "core/notes/KeptStretches.h"
+#include "core/notes/StepChanges.h"
 #include "core/notes/StepMaker.h"
 
 #include <algorithm>
 #include <cmath>
+#include <map>
 #include <utility>
 
 namespace cadrel::core {
@@ -26,10 +28,10 @@ ChangeNotes::ChangeNotes(const EventList& oldEvents, const EventList& newEvents,
                          std::int32_t simplify)
     : m_framerate(rules.framerate), m_oldCut(oldEvents, rules, m_numbers), m_newCut(newEvents, rules, m_numbers)
 {
-    const std::vector<KeptStretch> kept = findKeptStretches(m_oldCut, m_newCut);
-    StepList list = makeSteps(m_oldCut, m_newCut, kept);
+    const StepChanges changes(m_oldCut, m_newCut);
+    StepList list = makeSteps(m_oldCut, m_newCut, findKeptStretches(m_oldCut, m_newCut));
     for (std::size_t reel = 0; reel < list.reels.size(); ++reel) {
-        joinTrims(list.rows[reel], simplify);
+        joinTrims(list.rows[reel], simplify, changes);
         ReelNotes notes;
         notes.pair = list.reels[reel];
         notes.before = lengthOf(m_oldCut, notes.pair.oldReel);
@@ -39,13 +41,14 @@ ChangeNotes::ChangeNotes(const EventList& oldEvents, const EventList& newEvents,
         m_reels.push_back(std::move(notes));
     }
     number();
-    count(kept);
+    count();
 }
 
 /// Numbers the steps and adds up what each reel wins and loses.
 void ChangeNotes::number()
 {
     std::vector<std::int32_t> offsets(m_reels.size(), 0);
+    std::map<std::int32_t, std::size_t> betweenReels; // the numbers of moves, by their old places
     for (std::size_t reel = 0; reel < m_reels.size(); ++reel) {
         for (NoteEntry& entry : m_reels[reel].entries) {
             if (const NoteStep* const step = entry.step()) {
@@ -55,23 +58,39 @@ void ChangeNotes::number()
                     const std::size_t other = step->from.reel == reel ? step->place.reel : step->from.reel;
                     entry.lengthChange = step->place.reel == reel ? step->moved : -step->moved;
                     offsets[other] -= entry.lengthChange;
+                    betweenReels[step->changes.front().inOld->start] = entry.number;
                 }
                 offsets[reel] += entry.lengthChange;
                 m_totals.moved += step->moved;
             }
+            if (auto* const end = std::get_if<MoveEnd>(&entry.row))
+                end->step = betweenReels.at(end->move.inOld->start);
             entry.runningOffset = offsets[reel];
         }
     }
 }
 
-void ChangeNotes::count(const std::vector<KeptStretch>& kept)
+void ChangeNotes::count()
 {
     m_totals.before = m_oldCut.length();
     m_totals.after = m_newCut.length();
-    for (const KeptStretch& stretch : kept)
-        (stretch.isDoubled ? m_totals.doubled : m_totals.kept) += stretch.length;
+    for (const ReelNotes& reel : m_reels) {
+        for (const NoteEntry& entry : reel.entries) {
+            m_totals.kept += entry.kept() != nullptr ? entry.kept()->length : 0;
+            if (entry.step() == nullptr)
+                continue;
+            for (const PictureChange& change : entry.step()->changes)
+                m_totals.doubled += change.kind == ChangeKind::Doubled ? change.frames : 0;
+        }
+    }
     m_totals.lifted = m_totals.before - m_totals.kept;
     m_totals.inserted = m_totals.after - m_totals.kept - m_totals.doubled;
+}
+
+bool ReelNotes::isUnchanged() const
+{
+    return before == after &&
+           std::all_of(entries.begin(), entries.end(), [](const NoteEntry& entry) { return entry.kept() != nullptr; });
 }
 
 std::vector<const NoteEntry*> ChangeNotes::largestSteps() const

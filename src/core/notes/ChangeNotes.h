@@ -16,7 +16,8 @@
 
 namespace cadrel::core {
 
-/// Frames, and steps. Kept and lifted picture make the old length; kept, doubled and inserted picture the new one.
+/// Frames, and steps. Kept and lifted picture make the old length; kept, doubled and inserted picture the new one. What lies
+/// between joined trims counts as lifted and inserted, since their step replaces it.
 struct NoteTotals {
     std::int32_t before = 0; ///< length in the old cut
     std::int32_t after = 0;
@@ -30,12 +31,13 @@ struct NoteTotals {
 
 struct NoteEntry {
     NoteRow row;
-    std::size_t number = 0;         ///< of a step, from 1 through all reels; 0 for a kept stretch
+    std::size_t number = 0;         ///< of a step, from 1 through all reels; 0 for any other row
     std::int32_t lengthChange = 0;  ///< what the reel wins by the step; a move between reels counts for both
-    std::int32_t runningOffset = 0; ///< the sum of these changes with this one; of a kept stretch that before it
+    std::int32_t runningOffset = 0; ///< the sum of these changes with this one; of any other row that before it
 
     const NoteStep* step() const { return std::get_if<NoteStep>(&row); }
     const KeptStretch* kept() const { return std::get_if<KeptStretch>(&row); }
+    const MoveEnd* moveEnd() const { return std::get_if<MoveEnd>(&row); }
 };
 
 struct ReelNotes {
@@ -43,6 +45,9 @@ struct ReelNotes {
     std::int32_t before = 0;
     std::int32_t after = 0;
     std::vector<NoteEntry> entries;
+
+    /// Whether all of its picture stands where it stood.
+    bool isUnchanged() const;
 };
 
 /// How the change EDL was healed.
@@ -83,7 +88,7 @@ public:
 
 private:
     void number();
-    void count(const std::vector<KeptStretch>& kept);
+    void count();
 
     Framerate m_framerate;
     TextNumbers m_numbers;

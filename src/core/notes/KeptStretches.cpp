@@ -8,12 +8,68 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <queue>
+#include <functional>
+#include <map>
 #include <tuple>
 
 namespace cadrel::core {
 
 namespace {
+
+/// A part of a shared stretch that may be kept.
+struct Offer {
+    std::int32_t length; ///< at most so many frames are free
+    std::int32_t newStart;
+    std::int32_t oldStart;
+    std::size_t shared;
+
+    /// Of equal length, the earliest comes first.
+    bool operator<(const Offer& other) const
+    {
+        return std::tie(other.newStart, other.oldStart) < std::tie(newStart, oldStart);
+    }
+};
+
+/// Offers, of which the longest is taken first. Those of one length are only put in order when their turn comes, so that a
+/// million of them need no heap that fills the memory.
+class Offers {
+public:
+    bool isEmpty() const { return m_byLength.empty(); }
+
+    /// Of an empty offer nothing is kept.
+    void add(const Offer& offer)
+    {
+        if (offer.length == 0)
+            return;
+        OfLength& equals = m_byLength[offer.length];
+        equals.offers.push_back(offer);
+        if (equals.isHeap)
+            std::push_heap(equals.offers.begin(), equals.offers.end());
+    }
+
+    Offer takeLongest()
+    {
+        const auto longest = m_byLength.begin();
+        auto& [offers, isHeap] = longest->second;
+        if (!isHeap)
+            std::make_heap(offers.begin(), offers.end());
+        isHeap = true;
+        std::pop_heap(offers.begin(), offers.end());
+        const Offer best = offers.back();
+        offers.pop_back();
+        if (offers.empty())
+            m_byLength.erase(longest);
+        return best;
+    }
+
+private:
+    struct OfLength {
+        std::vector<Offer> offers;
+        bool isHeap = false;
+    };
+
+    std::map<std::int32_t, OfLength, std::greater<>> m_byLength;
+};
 
 /// Gives the frames of the new programme to those of the old one, one choice after the other.
 class Assignment {
@@ -38,19 +94,6 @@ public:
     }
 
 private:
-    struct Offer {
-        std::int32_t length; ///< at most so many frames are free
-        std::int32_t newStart;
-        std::int32_t oldStart;
-        std::size_t shared;
-
-        /// The longest comes first, of equal ones the earliest.
-        bool operator<(const Offer& other) const
-        {
-            return std::tie(length, other.newStart, other.oldStart) < std::tie(other.length, newStart, oldStart);
-        }
-    };
-
     void keep(std::int32_t oldStart, std::int32_t newStart, std::int32_t length, bool isDoubled)
     {
         m_takenNew.add(newStart, newStart + length);
@@ -86,23 +129,20 @@ private:
     /// Keeps the longest free stretch again and again, until nothing is free.
     void keepLongest(bool isDoubled)
     {
-        std::priority_queue<Offer> offers;
-        const auto offer = [&](std::size_t index) {
-            const Offer made = offerOf(index, isDoubled);
-            if (made.length > 0)
-                offers.push(made);
-        };
+        Offers offers;
         for (std::size_t index = 0; index < m_shared.size(); ++index) {
             if (!m_newCut.runs()[m_shared[index].newRun].isGap())
-                offer(index);
+                offers.add(offerOf(index, isDoubled));
         }
-        while (!offers.empty()) {
-            const Offer best = offers.top();
-            offers.pop();
+        while (!offers.isEmpty()) {
+            const Offer best = offers.takeLongest();
             const Offer now = offerOf(best.shared, isDoubled);
-            if (now.length == best.length && now.newStart == best.newStart)
+            if (now.length == best.length && now.newStart == best.newStart) {
                 keep(now.oldStart, now.newStart, now.length, isDoubled);
-            offer(best.shared);
+                offers.add(offerOf(best.shared, isDoubled));
+            } else {
+                offers.add(now);
+            }
         }
     }
 

@@ -37,6 +37,7 @@ enum class ChangeKind {
     TransitionAdded,   ///< a dissolve or wipe where a cut was
     TransitionRemoved, ///< a cut where a dissolve or wipe was
     TransitionChanged, ///< a dissolve or wipe of another length, type or place
+    Unchanged,         ///< kept picture between joined trims, which their step replaces by itself
 };
 
 struct PictureChange {
@@ -46,7 +47,7 @@ struct PictureChange {
     const EventBase* newShot = nullptr; ///< in the new cut; null where there is none
     std::optional<FrameSpan> inOld;     ///< where it stood, in the frames of the old programme
     std::optional<FrameSpan> inNew;     ///< where it stands
-    std::int32_t shots = 1;             ///< of a move: how many shots
+    std::int32_t shots = 1;             ///< of a move, and of unchanged picture: how many shots
     bool isPart = false;                ///< of a lift: the rest of the shot stays somewhere
 };
 
@@ -82,9 +83,18 @@ struct NoteStep {
     std::int32_t lengthChange() const { return action == StepAction::Replace ? inserted.length - removed : 0; }
 };
 
-/// The steps of a reel, and the stretches that are kept between them. A kept stretch stands before the steps that change
-/// the version of a shot in it.
-using NoteRow = std::variant<KeptStretch, NoteStep>;
+/// The other end of a move between reels. The move is a step of the reel that comes first; this stands in the other one.
+struct MoveEnd {
+    WorkPlace place;           ///< where the picture stands, or where it was
+    bool isTarget = false;     ///< it has come to here; else it has gone from here
+    std::size_t otherReel = 0; ///< place in the list of reels
+    PictureChange move;        ///< that of the step
+    std::size_t step = 0;      ///< its number; 0 until the steps are numbered
+};
+
+/// The steps of a reel, the stretches that are kept between them, and the other ends of moves. A kept stretch stands before
+/// the steps that change the version of a shot in it.
+using NoteRow = std::variant<KeptStretch, NoteStep, MoveEnd>;
 
 /// A reel of the old cut with that which it has become. One of them is missing where a reel is new or gone.
 struct ReelChange {

@@ -8,7 +8,7 @@
 #include <bit>
 #include <cstdint>
 #include <limits>
-#include <unordered_map>
+#include <span>
 #include <utility>
 
 namespace cadrel::core {
@@ -69,13 +69,47 @@ private:
     std::size_t m_count = 0;
 };
 
+struct Use {
+    SharedPicture stretch;
+    std::size_t index = 0;
+};
+
+/// The last uses of each old run. They lie together in memory, as they are looked at over and over.
+class LastUses {
+public:
+    explicit LastUses(const std::vector<SharedPicture>& shared)
+    {
+        std::size_t runs = 0;
+        for (const SharedPicture& stretch : shared)
+            runs = std::max(runs, stretch.oldRun + 1);
+        m_ofRuns.resize(runs);
+    }
+
+    std::span<const Use> of(std::size_t oldRun) const { return m_ofRuns[oldRun].uses; }
+    void add(const SharedPicture& stretch, std::size_t index)
+    {
+        OfRun& run = m_ofRuns[stretch.oldRun];
+        if (run.uses.size() < MostUsesLookedAt)
+            run.uses.push_back({stretch, index});
+        else
+            run.uses[run.next++ % MostUsesLookedAt] = {stretch, index};
+    }
+
+private:
+    struct OfRun {
+        std::vector<Use> uses;
+        std::size_t next = 0; ///< the oldest one, once there are as many as there may be
+    };
+
+    std::vector<OfRun> m_ofRuns;
+};
+
 class ChainSearch {
 public:
     explicit ChainSearch(const std::vector<SharedPicture>& shared)
         : m_shared(shared), m_chains(shared.size()), m_before(shared.size(), None), m_oldEnds(shared),
-          m_byOldEnd(m_oldEnds.count(), Chain())
+          m_byOldEnd(m_oldEnds.count(), Chain()), m_uses(shared)
     {
-        m_byEnds.reserve(shared.size());
     }
 
     std::vector<SharedPicture> find()
@@ -88,20 +122,26 @@ public:
                 chainUp(index, first);
             for (std::size_t index = first; index < end; ++index)
                 enter(index);
+            m_lastRun = {first, end};
             first = end;
         }
         return take();
     }
 
 private:
+    /// Stretches one after the other.
+    struct Range {
+        std::size_t first = 0;
+        std::size_t end = 0;
+    };
+
     /// `firstOfRun`: the first stretch of the same new run.
     void chainUp(std::size_t index, std::size_t firstOfRun)
     {
         const SharedPicture& stretch = m_shared[index];
         Chain best = m_byOldEnd.ofFirst(m_oldEnds.countUpTo(stretch.oldStart));
         best.worth += Chain::EndWorth;
-        const auto consider = [&](std::size_t before) {
-            const SharedPicture& earlier = m_shared[before];
+        const auto consider = [&](const SharedPicture& earlier, std::size_t before) {
             if (earlier.oldStart >= stretch.oldStart || earlier.newStart >= stretch.newStart ||
                 earlier.oldEnd() >= stretch.oldEnd() || earlier.newEnd() >= stretch.newEnd())
                 return;
@@ -113,14 +153,17 @@ private:
             if (overlap < stretch.length && best < chain)
                 best = chain;
         };
-        if (const auto joined = m_byEnds.find(endsKey(stretch.oldStart, stretch.newStart)); joined != m_byEnds.end())
-            consider(joined->second);
+        // What is joined on without an end between stands in the run just before, as runs follow each other.
+        for (std::size_t before = m_lastRun.first; before < m_lastRun.end; ++before) {
+            if (m_shared[before].oldEnd() == stretch.oldStart && m_shared[before].newEnd() == stretch.newStart)
+                consider(m_shared[before], before);
+        }
         for (std::size_t before = firstOfRun; before < index; ++before)
-            consider(before);
-        if (const auto uses = m_usesOfOldRun.find(stretch.oldRun); uses != m_usesOfOldRun.end()) {
-            const auto& all = uses->second;
-            for (std::size_t use = all.size() - std::min(all.size(), MostUsesLookedAt); use < all.size(); ++use)
-                consider(all[use]);
+            consider(m_shared[before], before);
+        // Those that end where this one starts, or before it, have been asked for by their ends.
+        for (const Use& use : m_uses.of(stretch.oldRun)) {
+            if (use.stretch.oldEnd() > stretch.oldStart)
+                consider(use.stretch, use.index);
         }
         m_before[index] = best.last;
         m_chains[index] = {best.worth + stretch.length * Chain::FrameWorth, index};
@@ -130,10 +173,7 @@ private:
     {
         const SharedPicture& stretch = m_shared[index];
         m_byOldEnd.raise(m_oldEnds.countUpTo(stretch.oldEnd()) - 1, m_chains[index]);
-        m_usesOfOldRun[stretch.oldRun].push_back(index);
-        const auto [joined, isNew] = m_byEnds.try_emplace(endsKey(stretch.oldEnd(), stretch.newEnd()), index);
-        if (!isNew && m_chains[joined->second] < m_chains[index])
-            joined->second = index;
+        m_uses.add(stretch, index);
     }
 
     std::vector<SharedPicture> take() const
@@ -159,18 +199,13 @@ private:
         return chain;
     }
 
-    static std::int64_t endsKey(std::int32_t oldEnd, std::int32_t newEnd)
-    {
-        return (std::int64_t{oldEnd} << 32) | newEnd;
-    }
-
     const std::vector<SharedPicture>& m_shared;
     std::vector<Chain> m_chains;       ///< the best that ends with each stretch
     std::vector<std::size_t> m_before; ///< the stretch before it in that chain
     const OldEnds m_oldEnds;
     PrefixMaximum<Chain> m_byOldEnd;
-    std::unordered_map<std::int64_t, std::size_t> m_byEnds;
-    std::unordered_map<std::size_t, std::vector<std::size_t>> m_usesOfOldRun;
+    LastUses m_uses;
+    Range m_lastRun; ///< of the new run before that in hand
 };
 
 } // namespace

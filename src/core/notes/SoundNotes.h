@@ -40,7 +40,7 @@ struct SoundChange {
 /// Where automation jumps in the new programme.
 struct AutomationJump {
     SecondsRange place;
-    std::string where; ///< the names of the tracks
+    std::vector<std::string> tracks; ///< their names
 };
 
 /// A piece of a clip that stands in the new programme.

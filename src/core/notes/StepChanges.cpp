@@ -388,8 +388,18 @@ std::vector<PictureChange> StepChanges::ofReplacing(const NoteStep& step, const 
 
 PictureChange StepChanges::ofMoving(FrameSpan inOld, FrameSpan inNew) const
 {
+    return ofKept(ChangeKind::Moved, inOld, inNew);
+}
+
+PictureChange StepChanges::ofUnchanged(const KeptStretch& kept) const
+{
+    return ofKept(ChangeKind::Unchanged, {kept.oldStart, kept.length}, {kept.newStart, kept.length});
+}
+
+PictureChange StepChanges::ofKept(ChangeKind kind, FrameSpan inOld, FrameSpan inNew) const
+{
     PictureChange change;
-    change.kind = ChangeKind::Moved;
+    change.kind = kind;
     change.frames = inOld.length;
     change.inOld = inOld;
     change.inNew = inNew;

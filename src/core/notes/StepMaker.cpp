@@ -224,8 +224,10 @@ private:
             m_waiting.push_back(slot);
             break;
         case Slot::Kind::Origin:
-            if (m_isInPlace[what.index])
+            if (m_isInPlace[what.index]) {
+                tellMoveEnd(what.index, slot);
                 break;
+            }
             if (const Slot& next = nextThatStays(slot); next.kind == Slot::Kind::Block)
                 replaceWaiting(m_blocks[next.index].first);
             else if (next.kind == Slot::Kind::End)
@@ -234,7 +236,9 @@ private:
             break;
         case Slot::Kind::Block:
             replaceWaiting(m_blocks[what.index].first);
-            if (!m_isInPlace[what.index])
+            if (m_isInPlace[what.index])
+                tellMoveEnd(what.index, slot);
+            else
                 rows.emplace_back(move(what.index));
             break;
         case Slot::Kind::Kept:
@@ -288,9 +292,28 @@ private:
                 m_frames->set(slot, m_slots[slot].frames.length);
         }
         m_isInPlace[block] = true;
-        const std::int32_t newStart = m_kept[moved.first].newStart;
-        step.changes = {m_changes.ofMoving(moved.inOld, {newStart, m_kept[moved.last].newEnd() - newStart})};
+        step.changes = {moveOf(moved)};
         return step;
+    }
+
+    PictureChange moveOf(const KeptBlock& moved) const
+    {
+        const std::int32_t newStart = m_kept[moved.first].newStart;
+        return m_changes.ofMoving(moved.inOld, {newStart, m_kept[moved.last].newEnd() - newStart});
+    }
+
+    /// Of a block that a step of another reel has moved.
+    void tellMoveEnd(std::size_t block, std::size_t slot)
+    {
+        if (m_blocks[block].stays)
+            return;
+        const std::size_t source = m_slots[m_originOf[block]].reel;
+        const std::size_t target = m_slots[m_slotOfBlock[block]].reel;
+        if (source == target)
+            return;
+        const bool isTarget = m_slots[slot].reel == target;
+        m_list.rows[m_slots[slot].reel].emplace_back(
+            MoveEnd{placeOf(slot), isTarget, isTarget ? source : target, moveOf(m_blocks[block])});
     }
 
     /// Carries out what has gathered between two kept stretches, as one step.

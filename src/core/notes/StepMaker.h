@@ -9,6 +9,8 @@
 
 namespace cadrel::core {
 
+class StepChanges;
+
 /// The way from the old to the new cut.
 struct StepList {
     std::vector<ReelChange> reels;
@@ -20,7 +22,7 @@ struct StepList {
 StepList makeSteps(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept);
 
 /// Joins steps that only trim and whose trims cancel out within `frames` frames into one step without a change of length,
-/// which replaces what lies between them, too. A `frames` of 0 joins none.
-void joinTrims(std::vector<NoteRow>& rows, std::int32_t frames);
+/// which replaces what lies between them, too, and says so. A `frames` of 0 joins none.
+void joinTrims(std::vector<NoteRow>& rows, std::int32_t frames, const StepChanges& changes);
 
 } // namespace cadrel::core

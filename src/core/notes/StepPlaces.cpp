@@ -52,6 +52,8 @@ StepPlaces::StepPlaces(const ChangeNotes& notes) : m_notes(notes), m_inOld(notes
             const NoteEntry& entry = reel.entries[index];
             if (entry.kept() != nullptr)
                 before = entry.kept();
+            else if (entry.step() == nullptr)
+                continue;
             else if (entry.step()->action == StepAction::Move)
                 addMove(entry, kept);
             else if (entry.step()->action == StepAction::Replace)

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "core/notes/StepChanges.h"
 #include "core/notes/StepMaker.h"
 
 #include <algorithm>
@@ -18,12 +19,13 @@ bool isTrim(const NoteStep& step)
 }
 
 /// Takes a kept stretch into a step that ends where it begins.
-void extendOver(NoteStep& step, const KeptStretch& kept)
+void extendOver(NoteStep& step, const KeptStretch& kept, const StepChanges& changes)
 {
     step.removed += kept.length;
     step.inserted.start = step.inserted.length == 0 ? kept.newStart : step.inserted.start;
     step.inserted.length = kept.newEnd() - step.inserted.start;
     step.removedFrames.push_back({kept.oldStart, kept.length});
+    step.changes.push_back(changes.ofUnchanged(kept));
 }
 
 void extendOver(NoteStep& step, const NoteStep& next)
@@ -37,7 +39,8 @@ void extendOver(NoteStep& step, const NoteStep& next)
 
 /// The place after the last of the rows from `first` on that make one step together, which goes to `joined`; `first` when
 /// there is none.
-std::size_t joinFrom(const std::vector<NoteRow>& rows, std::size_t first, std::int32_t frames, NoteStep& joined)
+std::size_t joinFrom(const std::vector<NoteRow>& rows, std::size_t first, std::int32_t frames,
+                     const StepChanges& changes, NoteStep& joined)
 {
     const auto* const begin = std::get_if<NoteStep>(&rows[first]);
     if (begin == nullptr || !isTrim(*begin) || begin->lengthChange() == 0)
@@ -53,7 +56,7 @@ std::size_t joinFrom(const std::vector<NoteRow>& rows, std::size_t first, std::i
         between += kept->length;
         if (between > frames)
             break;
-        extendOver(step, *kept);
+        extendOver(step, *kept, changes);
         extendOver(step, *next);
         if (step.lengthChange() == 0) {
             end = row + 2;
@@ -67,14 +70,14 @@ std::size_t joinFrom(const std::vector<NoteRow>& rows, std::size_t first, std::i
 
 } // namespace
 
-void joinTrims(std::vector<NoteRow>& rows, std::int32_t frames)
+void joinTrims(std::vector<NoteRow>& rows, std::int32_t frames, const StepChanges& changes)
 {
     if (frames <= 0)
         return;
     std::vector<NoteRow> joinedRows;
     for (std::size_t row = 0; row < rows.size();) {
         NoteStep joined;
-        const std::size_t end = joinFrom(rows, row, frames, joined);
+        const std::size_t end = joinFrom(rows, row, frames, changes, joined);
         if (end == row) {
             joinedRows.push_back(std::move(rows[row++]));
         } else {

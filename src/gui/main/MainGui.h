@@ -7,6 +7,7 @@
 #include "gui/files/FileDialog.h"
 #include "gui/look/LookAndFeel.h"
 #include "gui/main/MainControls.h"
+#include "gui/settings/SettingsDialog.h"
 #include "gui/table/EventTableModel.h"
 #include "gui/video/NewVideosDialog.h"
 
@@ -80,6 +81,7 @@ private:
 
     void handle(const core::ChangeContext& context);
     void setModel(core::DataModel* model);
+    void closeSheets();
     void letGoOfModel();
     void showModel();
     void showList(std::int32_t listKind);
@@ -137,6 +139,7 @@ private:
     bool m_isModelChanging = false;
     std::wstring m_saveFolder;
     MainControls m_controls;
+    SettingsDialog m_settingsDialog;
     NewVideosDialog m_videosDialog;
     FileDialog m_fileDialog;
     TcEditDialog m_editDialog;

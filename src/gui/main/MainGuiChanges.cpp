@@ -30,6 +30,8 @@ void MainGui::handle(const ChangeContext& context)
     switch (context.type) {
     case ChangeContext::DataModelChanged:
         return setModel(static_cast<const core::DataModelChangeContext&>(context).dataModel);
+    case ChangeContext::SettingsChanged:
+        return m_settingsDialog.setSettings(m_model ? &m_model->settings() : nullptr);
     case ChangeContext::EventListChanged:
         return listReplaced(static_cast<const core::EventListChangeContext&>(context).listKind);
     case ChangeContext::VideoListChanged:
@@ -52,17 +54,28 @@ void MainGui::setModel(core::DataModel* model)
     m_isPreviewTold = false;
     guardSystem([this] { m_editDialog.modelChanged(); });
     if (model != m_model || !model) {
-        guardSystem([this] { m_videosDialog.setVisible(false); });
+        closeSheets();
         letGoOfModel();
     }
     m_model = model;
     guardSystem(
         [this] { m_fileDialog.setModel(m_model, m_model && m_engine ? m_engine->getProjectName() : std::wstring()); });
+    guardSystem([this] { m_settingsDialog.setSettings(m_model ? &m_model->settings() : nullptr); });
     guardSystem([this] { showVideoList(); });
     if (m_model)
         guardSystem([this] { showModel(); });
     guardSystem([this] { showPreviewState(); });
     updateEnablement();
+}
+
+/// What was begun isn't stored in a model that goes.
+void MainGui::closeSheets()
+{
+    guardSystem([this] {
+        m_settingsDialog.setSettings(nullptr);
+        m_settingsDialog.setVisible(false);
+    });
+    guardSystem([this] { m_videosDialog.setVisible(false); });
 }
 
 /// Without a project there is no frame rate either.

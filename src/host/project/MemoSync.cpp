@@ -3,13 +3,17 @@
 #include "host/project/MemoSync.h"
 
 #include "core/edl/EventBase.h"
+#include "host/border/HostFailure.h"
+#include "host/project/EventPrint.h"
 #include "host/project/MemoPlaces.h"
 #include "host/project/PlacedMemos.h"
+#include "host/project/PreviewRecord.h"
 #include "host/track/CoveredRanges.h"
 #include "host/track/Instant.h"
 #include "host/track/Marker.h"
 #include "host/track/Track.h"
 #include "util/Result.h"
+#include "velmark/Attributes.h"
 
 #include <algorithm>
 #include <cmath>
@@ -19,6 +23,8 @@
 #include <utility>
 
 using cadrel::core::SecondsRange;
+using Velmark::AttributeKey;
+using Velmark::FVariant;
 using Velmark::IEditTransaction;
 using Velmark::IHostContext;
 
@@ -37,6 +43,19 @@ std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
     for (const PlacedMemo& memo : memos)
         ids.insert(memo.id);
     return ids;
+}
+
+void markFollowed(const HostEvent& copy)
+{
+    const std::uint32_t print = placePrintOf(*copy.node());
+    requireOk(copy.node()->setAttribute(AttributeKey::Followed, FVariant::integer(print), true));
+}
+
+/// Whether its timecodes are frames under that rate, which needn't be that of the project.
+bool isValidUnder(const core::Framerate& framerate, const core::EventBase& event)
+{
+    return event.srcIn().isValid(framerate) && event.srcOut().isValid(framerate) && event.dstIn().isValid(framerate) &&
+           event.dstOut().isValid(framerate);
 }
 
 /// The new ids that are given to memos of a track one after the other.
@@ -82,8 +101,7 @@ std::vector<MemoSync::Shown> MemoSync::stretchesOf(const Previewed& previewed)
     CoveredRanges later;
     for (auto next = previewed.events.rbegin(); next != previewed.events.rend(); ++next) {
         const core::EventBase& event = **next;
-        if (event.hasFlaw(core::EventFlaw::TimecodeInvalid) || !(event.srcIn() < event.srcOut()) ||
-            !(event.dstIn() < event.dstOut()))
+        if (!isValidUnder(framerate, event) || !(event.srcIn() < event.srcOut()) || !(event.dstIn() < event.dstOut()))
             continue;
         const SecondsRange whole{event.dstIn().toSeconds(framerate) + offset,
                                  event.dstOut().toSeconds(framerate) + offset};
@@ -97,7 +115,7 @@ std::vector<MemoSync::Shown> MemoSync::stretchesOf(const Previewed& previewed)
             const SecondsRange source{srcIn + (piece->start - whole.start),
                                       std::min(srcIn + (piece->end - whole.start), srcOut)};
             if (!isEmpty(source))
-                shown.push_back({*next, {source, *piece}, {}});
+                shown.push_back({*next, static_cast<std::size_t>(piece - pieces.rbegin()), {source, *piece}, {}});
         }
     }
     std::ranges::reverse(shown);
@@ -109,17 +127,60 @@ MemoSync::Memo MemoSync::memoOf(const HostEvent& event)
     return {event.getUserId(), event.getName(), event.getStart(), event.getEnd()};
 }
 
-void MemoSync::Remembered::add(Memo memo)
+bool MemoSync::Remembered::contains(std::int64_t id) const
 {
-    byId.emplace(memo.id, memo);
-    copies.insert(std::move(memo));
+    const auto found = copies.lower_bound(firstOf(id));
+    return found != copies.end() && found->id == id;
 }
 
-const MemoSync::Memo* MemoSync::Remembered::find(std::int64_t id) const
+/// Below all of its id and name.
+MemoSync::Memo MemoSync::firstOf(std::int64_t id, std::wstring name)
 {
-    const auto found = byId.find(id);
-    return found != byId.end() ? &found->second : nullptr;
+    constexpr double First = std::numeric_limits<double>::lowest();
+    return {id, std::move(name), First, First};
 }
+
+/// The copies in a stretch as they were, of which those are found that aren't there any more.
+class MemoSync::CopiesThatWere {
+public:
+    explicit CopiesThatWere(const Remembered& remembered) : m_copies(remembered.copies) {}
+
+    /// Whether the copy is one of them as it was.
+    bool isStillThere(const Memo& copy)
+    {
+        const auto found = m_copies.find(copy);
+        if (found == m_copies.end())
+            return false;
+        m_present.insert(&*found);
+        return true;
+    }
+    /// To be called once all that are still there were asked for. From then on the others are given.
+    void settle()
+    {
+        if (m_present.size() == m_copies.size())
+            return;
+        for (const Memo& copy : m_copies) {
+            if (!m_present.contains(&copy))
+                m_gone.insert(m_gone.end(), copy);
+        }
+    }
+    /// What an edited copy was like, once; one of its name before others. Nothing where that isn't known.
+    std::optional<Memo> take(const Memo& edited)
+    {
+        auto found = m_gone.lower_bound(firstOf(edited.id, edited.name));
+        if (found == m_gone.end() || found->id != edited.id || found->name != edited.name)
+            found = m_gone.lower_bound(firstOf(edited.id));
+        if (found == m_gone.end() || found->id != edited.id)
+            return std::nullopt;
+        return std::move(m_gone.extract(found).value());
+    }
+    const std::set<Memo>& rest() const { return m_gone; }
+
+private:
+    const std::set<Memo>& m_copies;
+    std::set<const Memo*> m_present;
+    std::set<Memo> m_gone;
+};
 
 MemoSync::Preview MemoSync::previewOf(const PlacedMemos& memos, const Previewed& previewed)
 {
@@ -169,34 +230,64 @@ public:
     }
 
 private:
-    /// The memos of those adrift stay.
     void followStretch(const PlacedMemos& placed, const Shown& shown, const Remembered* remembered)
+    {
+        MemosById sources(sourcesOf(placed, shown.stretch, shown.copies));
+        if (remembered)
+            followEdits(shown, sources, *remembered);
+        else
+            compare(shown, sources);
+    }
+
+    /// Several memos may have the same id, as attributes travel with what is pasted. Then each follows the copy that stood
+    /// where the memo is shown.
+    void followEdits(const Shown& shown, MemosById& sources, const Remembered& remembered)
+    {
+        const Stretch& stretch = shown.stretch;
+        // Another copy of the same memo may have been edited, or the memo itself.
+        CopiesThatWere gone(remembered);
+        std::vector<PlacedMemo> edited = shown.copies;
+        std::erase_if(edited, [&](const PlacedMemo& copy) {
+            const bool isUntouched = gone.isStillThere(memoOf(copy.event));
+            if (isUntouched)
+                sources.take(copy.id, stretch.toSource(copy.span.start));
+            return isUntouched;
+        });
+        gone.settle();
+        std::erase_if(edited, [&](const PlacedMemo& copy) {
+            const std::optional<Memo> before = gone.take(memoOf(copy.event));
+            // One that was pasted is a memo of its own. One of which nothing is known was edited while nobody followed.
+            if (!before && remembered.contains(copy.id))
+                return false;
+            return carryOver(copy, sources, stretch, before);
+        });
+        // What the user has written in the real programme meanwhile has no copy that he could have removed, and the memos of
+        // those adrift stay.
+        for (const Memo& removed : gone.rest()) {
+            if (m_adrift.contains(removed.id))
+                continue;
+            if (const auto memo = sources.take(removed.id, stretch.toSource(removed.start)))
+                remove(*memo);
+        }
+        for (const PlacedMemo& copy : edited)
+            writeMemoOf(copy, stretch);
+    }
+
+    /// As long as nothing is known of what the user has done, the numbers tell whether he has removed or written something.
+    void compare(const Shown& shown, MemosById& sources)
     {
         const Stretch& stretch = shown.stretch;
         std::vector<PlacedMemo> copies = shown.copies;
-        MemosById sources(sourcesOf(placed, stretch, copies));
-        if (remembered)
-            keepEdited(copies, sources, *remembered);
         const std::size_t copyCount = copies.size();
         const std::size_t sourceCount = sources.size();
-
-        std::erase_if(copies, [&](const PlacedMemo& copy) {
-            std::optional<PlacedMemo> memo = sources.take(copy.id);
-            if (memo)
-                carryOver(copy.event, *memo, stretch, remembered ? remembered->find(memo->id) : nullptr);
-            return memo.has_value();
-        });
-        // What is left has no partner. As long as nothing is known of what the user has done, the numbers tell whether he
-        // has removed or written something.
-        if (remembered || sourceCount > copyCount) {
-            for (PlacedMemo& memo : sources.rest()) {
-                if (m_adrift.contains(memo.id))
-                    continue;
-                noteChange(memo.span);
-                memo.event.remove(m_transaction);
+        std::erase_if(copies, [&](const PlacedMemo& copy) { return carryOver(copy, sources, stretch, std::nullopt); });
+        if (sourceCount > copyCount) {
+            for (const PlacedMemo& memo : sources.rest()) {
+                if (!m_adrift.contains(memo.id))
+                    remove(memo);
             }
         }
-        if (remembered || copyCount > sourceCount) {
+        if (copyCount > sourceCount) {
             for (const PlacedMemo& copy : copies)
                 writeMemoOf(copy, stretch);
         }
@@ -226,34 +317,28 @@ private:
         return found;
     }
 
-    /// Leaves those that the user has edited, and of the memos those whose copy he has edited or removed.
-    static void keepEdited(std::vector<PlacedMemo>& copies, MemosById& sources, const Remembered& remembered)
+    /// False when the copy has no memo. What it was like is nothing where that isn't known.
+    bool carryOver(const PlacedMemo& copy, MemosById& sources, const Stretch& stretch,
+                   const std::optional<Memo>& before)
     {
-        // Another copy of the same memo may have been edited, or the memo itself.
-        std::erase_if(copies, [&](const PlacedMemo& copy) {
-            const bool isUntouched = remembered.copies.contains(memoOf(copy.event));
-            if (isUntouched)
-                sources.take(copy.id);
-            return isUntouched;
-        });
-        // What the user has written in the real programme meanwhile has no copy that he could have removed.
-        const std::set<std::int64_t> edited = idsOf(copies);
-        for (const PlacedMemo& memo : sources.rest()) {
-            if (!edited.contains(memo.id) && !remembered.find(memo.id))
-                sources.take(memo.id);
+        std::optional<PlacedMemo> memo =
+            sources.take(copy.id, stretch.toSource(before ? before->start : copy.span.start));
+        if (memo) {
+            carryOver(copy.event, *memo, stretch, before);
+            markFollowed(copy.event);
         }
+        return memo.has_value();
     }
 
-    /// What the copy was like is null where that isn't known.
-    void carryOver(const HostEvent& copy, PlacedMemo& placed, const Stretch& stretch, const Memo* remembered)
+    void carryOver(const HostEvent& copy, PlacedMemo& placed, const Stretch& stretch, const std::optional<Memo>& before)
     {
         HostEvent& memo = placed.event;
         // The memo may have been edited itself, or by another copy.
         const Memo edited = memoOf(copy);
-        const bool isRenamed = !remembered || edited.name != remembered->name;
+        const bool isRenamed = !before || edited.name != before->name;
         if (isRenamed && memo.getName() != edited.name)
             memo.setName(m_transaction, edited.name);
-        if (remembered && edited.start == remembered->start && edited.end == remembered->end)
+        if (before && edited.start == before->start && edited.end == before->end)
             return;
 
         // What hangs over an edge of the stretch isn't in the preview, and stays.
@@ -281,6 +366,13 @@ private:
         noteChange(span);
         Marker{span.start, span.end, copy.getName(), {}, copy.getUserId()}.insertInto(m_hostContext, m_transaction,
                                                                                       m_memos);
+        markFollowed(copy);
+    }
+
+    void remove(const PlacedMemo& memo)
+    {
+        noteChange(memo.span);
+        HostEvent(memo.event).remove(m_transaction);
     }
 
     /// Notes that a memo isn't there any more, or is from now on.
@@ -304,29 +396,56 @@ private:
     CoveredRanges m_changed; ///< since the memos were placed
 };
 
+void MemoSync::forgetCopies(const Events& events)
+{
+    m_remembered.clear();
+    for (const auto& event : events)
+        m_remembered.try_emplace(event);
+}
+
 void MemoSync::remember(const Track& memos, const Previewed& previewed)
 {
-    // After a failure nothing is known. What is known in part would look as if the user had written the rest.
-    m_remembered.clear();
-    std::map<std::shared_ptr<core::EventBase>, Remembered> found;
-    for (const auto& event : previewed.events)
-        found.try_emplace(event);
+    // What is known in part would look as if the user had written the rest.
+    forgetCopies(previewed.events);
     const PlacedMemos placed(memos);
-    if (!placed.all().empty()) {
-        for (const Shown& shown : previewOf(placed, previewed).shown) {
-            for (const PlacedMemo& copy : shown.copies)
-                found[shown.event].add(memoOf(copy.event));
+    if (placed.all().empty())
+        return;
+    auto found = m_remembered;
+    const Preview preview = previewOf(placed, previewed);
+    const auto edited = editedSince(memos, preview.shown);
+    for (const Shown& shown : preview.shown) {
+        for (const PlacedMemo& copy : shown.copies) {
+            if (!edited.contains(copy.event.node()))
+                found[shown.event][shown.piece].copies.insert(memoOf(copy.event));
         }
     }
     m_remembered = std::move(found);
 }
 
-std::vector<HostEvent> MemoSync::adrift(const Track& memos, const Previewed& previewed)
+bool MemoSync::isFollowed(const HostEvent& copy)
 {
-    std::vector<HostEvent> events;
-    for (const PlacedMemo& memo : previewOf(PlacedMemos(memos), previewed).adrift)
-        events.push_back(memo.event);
-    return events;
+    FVariant print;
+    return copy.node()->getAttribute(AttributeKey::Followed, print) == Velmark::ResultOk && print.isInteger() &&
+           print.asInteger() == placePrintOf(*copy.node());
+}
+
+std::set<const Velmark::IProjectNode*> MemoSync::editedSince(const Track& memos, const std::vector<Shown>& shown)
+{
+    std::vector<PreviewRecord::Node> copies;
+    for (const Shown& each : shown) {
+        for (const PlacedMemo& copy : each.copies) {
+            if (!isFollowed(copy.event))
+                copies.push_back(PreviewRecord::Node::share(copy.event.node()));
+        }
+    }
+    if (copies.empty())
+        return {};
+    if (const auto record = PreviewRecord::keptBy(memos))
+        copies = record->others(std::move(copies));
+    std::set<const Velmark::IProjectNode*> edited;
+    for (const PreviewRecord::Node& copy : copies)
+        edited.insert(copy.get());
+    return edited;
 }
 
 void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTransaction& transaction)
@@ -336,9 +455,18 @@ void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTrans
         return;
     const Preview preview = previewOf(placed, previewed);
     Following(m_hostContext, memos, preview, transaction).follow(std::move(placed), [this](const Shown& shown) {
-        const auto remembered = m_remembered.find(shown.event);
-        return remembered != m_remembered.end() ? &remembered->second : nullptr;
+        return rememberedOf(shown);
     });
+}
+
+const MemoSync::Remembered* MemoSync::rememberedOf(const Shown& shown) const
+{
+    static const Remembered NoCopies;
+    const auto ofEvent = m_remembered.find(shown.event);
+    if (ofEvent == m_remembered.end())
+        return nullptr;
+    const auto ofPiece = ofEvent->second.find(shown.piece);
+    return ofPiece != ofEvent->second.end() ? &ofPiece->second : &NoCopies;
 }
 
 } // namespace cadrel::host

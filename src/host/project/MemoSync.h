@@ -6,6 +6,7 @@
 #include "core/time/SecondsRange.h"
 #include "host/track/HostEvent.h"
 
+#include <cstddef>
 #include <cstdint>
 #include <map>
 #include <memory>
@@ -16,6 +17,7 @@
 namespace Velmark {
 class IEditTransaction;
 class IHostContext;
+class IProjectNode;
 } // namespace Velmark
 
 namespace cadrel::core {
@@ -50,11 +52,16 @@ public:
     /// Applies the edits of the copies to their memos. A copy that wasn't remembered is compared with its memo.
     /// Throws Result::HostObjectMissing and Result::HostCallFailed.
     void follow(const Track& memos, const Previewed& previewed, Velmark::IEditTransaction& transaction);
-    /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise.
+    /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise. One that
+    /// was edited and that its memo hasn't followed isn't noted, so that it is followed the next time. After a failure nothing
+    /// is noted.
     void remember(const Track& memos, const Previewed& previewed);
+    /// From now on the copies are compared with their memos, and their number tells what the user has removed or written.
     void forget() { m_remembered.clear(); }
-    /// The memos after the preview offset that stand in no stretch of the preview, and so have no part in what is followed.
-    static std::vector<HostEvent> adrift(const Track& memos, const Previewed& previewed);
+    /// The same, but none counts as removed.
+    void forgetCopies(const Events& events);
+    /// Whether a copy is as it was when its memo followed it last.
+    static bool isFollowed(const HostEvent& copy);
 
 private:
     /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's
@@ -74,18 +81,17 @@ private:
 
         auto operator<=>(const Memo&) const = default;
     };
-    /// The copies of a previewed event as they were.
+    /// The copies in a stretch as they were.
     struct Remembered {
         std::set<Memo> copies;
-        std::map<std::int64_t, Memo> byId; ///< the first of each id
 
-        void add(Memo memo);
-        /// Null when there is none.
-        const Memo* find(std::int64_t id) const;
+        bool contains(std::int64_t id) const;
     };
+    class CopiesThatWere;
     /// A stretch with the copies that belong to it.
     struct Shown {
         std::shared_ptr<core::EventBase> event;
+        std::size_t piece; ///< of what is left of the event
         Stretch stretch;
         std::vector<PlacedMemo> copies;
     };
@@ -97,12 +103,18 @@ private:
     };
     class Following;
 
+    /// Null where nothing is known of the event.
+    const Remembered* rememberedOf(const Shown& shown) const;
     static std::vector<Shown> stretchesOf(const Previewed& previewed);
     static Preview previewOf(const PlacedMemos& memos, const Previewed& previewed);
     static Memo memoOf(const HostEvent& event);
+    static Memo firstOf(std::int64_t id, std::wstring name = {});
+    /// Of the copies those that their memos haven't followed and that aren't as they were written.
+    static std::set<const Velmark::IProjectNode*> editedSince(const Track& memos, const std::vector<Shown>& shown);
 
     Velmark::IHostContext* m_hostContext;
-    std::map<std::shared_ptr<core::EventBase>, Remembered> m_remembered;
+    /// By event and piece.
+    std::map<std::shared_ptr<core::EventBase>, std::map<std::size_t, Remembered>> m_remembered;
 };
 
 } // namespace cadrel::host

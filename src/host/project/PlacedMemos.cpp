@@ -4,6 +4,9 @@
 
 #include "host/track/Track.h"
 
+#include <iterator>
+#include <utility>
+
 namespace cadrel::host {
 
 std::vector<PlacedMemo> PlacedMemos::read(const Track& track)
@@ -29,19 +32,23 @@ HighestNumber PlacedMemos::endsOf(const std::vector<PlacedMemo>& memos)
 MemosById::MemosById(std::vector<PlacedMemo> memos)
 {
     for (PlacedMemo& memo : memos) {
-        m_indexes.emplace(memo.id, m_memos.size());
+        m_indexes.emplace(memo.id, memo.span.start, m_memos.size());
         m_memos.emplace_back(std::move(memo));
     }
 }
 
-std::optional<PlacedMemo> MemosById::take(std::int64_t id)
+std::optional<PlacedMemo> MemosById::take(std::int64_t id, double start)
 {
-    const auto found = m_indexes.lower_bound({id, 0});
-    if (found == m_indexes.end() || found->first != id)
+    const auto isOfId = [&](auto place) { return place != m_indexes.end() && std::get<0>(*place) == id; };
+    auto nearest = m_indexes.lower_bound({id, start, 0});
+    const auto before = nearest != m_indexes.begin() ? std::prev(nearest) : m_indexes.end();
+    if (isOfId(before) && (!isOfId(nearest) || start - std::get<1>(*before) < std::get<1>(*nearest) - start))
+        nearest = before;
+    if (!isOfId(nearest))
         return std::nullopt;
-    std::optional<PlacedMemo> memo = std::exchange(m_memos[found->second], std::nullopt);
-    m_indexes.erase(found);
-    return memo;
+    const std::size_t index = std::get<2>(*nearest);
+    m_indexes.erase(nearest);
+    return std::exchange(m_memos[index], std::nullopt);
 }
 
 std::vector<PlacedMemo> MemosById::rest() const

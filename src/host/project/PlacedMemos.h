@@ -12,7 +12,7 @@
 #include <cstdint>
 #include <optional>
 #include <set>
-#include <utility>
+#include <tuple>
 #include <vector>
 
 namespace cadrel::host {
@@ -50,20 +50,20 @@ private:
     HighestNumber m_ends;
 };
 
-/// Memos in an order, from which those of an id are taken, the first one first.
+/// Memos in an order, from which those of an id are taken.
 class MemosById {
 public:
     explicit MemosById(std::vector<PlacedMemo> memos);
 
     std::size_t size() const { return m_indexes.size(); }
-    /// Nothing when there is none.
-    std::optional<PlacedMemo> take(std::int64_t id);
+    /// The one of that id that starts nearest to a time; nothing when there is none.
+    std::optional<PlacedMemo> take(std::int64_t id, double start);
     /// Those that are left.
     std::vector<PlacedMemo> rest() const;
 
 private:
     std::vector<std::optional<PlacedMemo>> m_memos;
-    std::set<std::pair<std::int64_t, std::size_t>> m_indexes;
+    std::set<std::tuple<std::int64_t, double, std::size_t>> m_indexes; ///< by id and start
 };
 
 } // namespace cadrel::host

@@ -7,6 +7,7 @@
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
 #include "host/border/NumberList.h"
+#include "host/project/EventPrint.h"
 #include "host/project/HostFramerate.h"
 #include "host/track/Instant.h"
 #include "host/track/Track.h"
@@ -16,8 +17,8 @@
 #include <algorithm>
 #include <cmath>
 #include <cstddef>
-#include <string>
-#include <tuple>
+#include <span>
+#include <utility>
 
 using namespace Velmark;
 
@@ -25,36 +26,41 @@ namespace cadrel::host {
 
 namespace {
 
+using Numbers = std::vector<double>;
+
 /// In seconds; no time of a project is further away, and as instants they all fit in 64 bits.
 constexpr double FurthestTime = 1e9;
+constexpr double Day = 86400.0;
 
-std::int64_t toInstant(double seconds)
-{
-    return std::llround(seconds / core::SameInstant);
-}
+/// The second number of what is stored. What is stored without it has one number or an even count.
+constexpr double NamesLayout = 1.0;
+constexpr double ContentsLayout = 2.0;
+constexpr std::size_t NamesHeadSize = 5;
+constexpr std::size_t HeadSize = 7;
+constexpr std::size_t EventSize = 4;
 
 Counted<IProjectNode> nodeOf(const Track& track)
 {
     return required(query<IProjectNode>(track.node()));
 }
 
-/// The second number of what is stored. What is stored without it has one number or an even count.
-constexpr double Layout = 1.0;
-constexpr std::size_t HeadSize = 5;
-
-/// The name of an event as a number, which is below FurthestTime.
-double numberOf(const std::wstring& name)
+/// Those under a key; nothing when they are none of a record.
+std::optional<Numbers> numbersOn(const Track& track, const char* key)
 {
-    core::serialize::ByteArchive characters;
-    for (const wchar_t character : name)
-        characters << static_cast<std::uint32_t>(character);
-    return static_cast<double>(characters.crc32() >> 3);
+    std::optional<Numbers> numbers = readNumbers(*nodeOf(track), key);
+    const auto isTime = [](double number) { return std::abs(number) <= FurthestTime; };
+    if (numbers && !std::ranges::all_of(*numbers, isTime))
+        numbers.reset();
+    return numbers;
 }
 
-/// As they are stored.
-std::array<double, 4> numbersOf(IProjectNode& event)
+/// Below FurthestTime.
+double checksumOf(std::span<const double> numbers)
 {
-    return {event.getStart(nullptr), event.getEnd(nullptr), event.getSourceOffset(nullptr), numberOf(nameOf(event))};
+    core::serialize::ByteArchive bytes;
+    for (const double number : numbers)
+        bytes << number;
+    return static_cast<double>(bytes.crc32() >> 3);
 }
 
 std::uint32_t flagsOf(const core::Framerate& framerate)
@@ -72,16 +78,38 @@ std::optional<core::Framerate> framerateFrom(double rate, double flags)
     return framerate;
 }
 
+/// What is written comes from the day that timecodes name and from before the start, which is later than all that was there.
+bool isSoundHead(const PreviewRecord::Head& head)
+{
+    return head.start > 0.0 && head.end.value_or(head.start) <= 2.0 * (head.start + Day);
+}
+
 } // namespace
+
+struct PreviewRecord::StoredHead {
+    Head head;
+    double checksum; ///< of the events
+
+    static bool isOne(const Numbers& numbers) { return numbers.size() == HeadSize && numbers[1] == ContentsLayout; }
+    static std::optional<StoredHead> of(const Numbers& numbers)
+    {
+        if (!isOne(numbers) || numbers.back() != checksumOf(std::span(numbers).first(HeadSize - 1)))
+            return std::nullopt;
+        const double start = numbers[0];
+        const double end = numbers[4];
+        const Head head{start, end < start ? std::nullopt : std::optional(end), framerateFrom(numbers[2], numbers[3])};
+        return isSoundHead(head) ? std::optional(StoredHead{head, numbers[5]}) : std::nullopt;
+    }
+};
 
 PreviewRecord PreviewRecord::ofContent(const Track& track, double start, const core::Framerate& framerate)
 {
-    PreviewRecord record(start);
+    PreviewRecord record({start, std::nullopt, std::nullopt}, Compared::Contents);
     if (!framerate.isUnknown())
-        record.m_framerate = framerate;
+        record.m_head.framerate = framerate;
     for (const Node& child : childrenOf(*nodeOf(track))) {
         if (!isBefore(child->getStart(nullptr), start))
-            record.add(numbersOf(*child));
+            record.add(record.numbersOf(*child));
     }
     for (const Node& curve : curvesOf(*track.node())) {
         for (const Node& point : childrenOf(*curve)) {
@@ -95,40 +123,57 @@ PreviewRecord PreviewRecord::ofContent(const Track& track, double start, const c
 
 std::optional<PreviewRecord> PreviewRecord::keptBy(const Track& track)
 {
-    const std::optional<std::vector<double>> numbers = readNumbers(*nodeOf(track), AttributeKey::Preview);
-    const auto isTime = [](double number) { return std::abs(number) <= FurthestTime; };
-    if (!numbers || numbers->empty() || !std::ranges::all_of(*numbers, isTime))
+    const std::optional<Numbers> numbers = numbersOn(track, AttributeKey::Preview);
+    if (!numbers || numbers->empty())
         return std::nullopt;
-    return numbers->size() == 1 || numbers->size() % 2 == 0 ? ofPlaces(*numbers) : ofNumbers(*numbers);
+    std::optional<PreviewRecord> record;
+    if (!StoredHead::isOne(*numbers)) {
+        record = numbers->size() == 1 || numbers->size() % 2 == 0 ? ofPlaces(*numbers) : ofNames(*numbers);
+    } else if (const auto stored = StoredHead::of(*numbers)) {
+        const Numbers events = numbersOn(track, AttributeKey::PreviewEvents).value_or(Numbers());
+        if (events.size() % EventSize != 0 || stored->checksum != checksumOf(events))
+            return std::nullopt;
+        record = PreviewRecord(stored->head, Compared::Contents);
+        record->add(events, 0);
+    }
+    return record && record->isSound() ? record : std::nullopt;
 }
 
-std::optional<PreviewRecord> PreviewRecord::ofPlaces(const std::vector<double>& numbers)
+std::optional<PreviewRecord::Head> PreviewRecord::headKeptBy(const Track& track)
 {
-    PreviewRecord record(numbers.front());
-    record.m_hasPlacesAlone = true;
+    const std::optional<Numbers> numbers = numbersOn(track, AttributeKey::Preview);
+    if (numbers && StoredHead::isOne(*numbers)) {
+        const auto stored = StoredHead::of(*numbers);
+        return stored ? std::optional(stored->head) : std::nullopt;
+    }
+    const auto record = keptBy(track);
+    return record ? std::optional(record->m_head) : std::nullopt;
+}
+
+std::optional<PreviewRecord> PreviewRecord::ofPlaces(const Numbers& numbers)
+{
+    PreviewRecord record({numbers.front(), std::nullopt, std::nullopt}, Compared::Places);
     if (numbers.size() == 1)
         return record;
-    if (numbers[1] < record.m_start)
+    if (numbers[1] < record.start())
         return std::nullopt;
     for (std::size_t index = 2; index < numbers.size(); index += 2)
-        record.add({numbers[index], numbers[index + 1], 0.0, 0.0});
-    record.m_end = numbers[1];
+        record.add(Event{numbers[index], numbers[index + 1], 0.0, 0.0});
+    record.reachTo(numbers[1]);
     return record;
 }
 
-std::optional<PreviewRecord> PreviewRecord::ofNumbers(const std::vector<double>& numbers)
+std::optional<PreviewRecord> PreviewRecord::ofNames(const Numbers& numbers)
 {
-    constexpr std::size_t EventSize = std::tuple_size_v<Content>;
-    if (numbers.size() < HeadSize || (numbers.size() - HeadSize) % EventSize != 0 || numbers[1] != Layout)
+    if (numbers.size() < NamesHeadSize || (numbers.size() - NamesHeadSize) % EventSize != 0 ||
+        numbers[1] != NamesLayout)
         return std::nullopt;
-    PreviewRecord record(numbers.front());
-    record.m_framerate = framerateFrom(numbers[2], numbers[3]);
+    PreviewRecord record({numbers.front(), std::nullopt, framerateFrom(numbers[2], numbers[3])}, Compared::Names);
     const double end = numbers[4];
-    if (end < record.m_start)
-        return numbers.size() == HeadSize ? std::optional(record) : std::nullopt;
-    for (std::size_t index = HeadSize; index < numbers.size(); index += EventSize)
-        record.add({numbers[index], numbers[index + 1], numbers[index + 2], numbers[index + 3]});
-    record.m_end = end;
+    if (end < record.start())
+        return numbers.size() == NamesHeadSize ? std::optional(record) : std::nullopt;
+    record.add(numbers, NamesHeadSize);
+    record.reachTo(end);
     return record;
 }
 
@@ -140,45 +185,73 @@ bool PreviewRecord::isKeptBy(const Track& track)
 void PreviewRecord::dropFrom(const Track& track)
 {
     removeNumbers(*nodeOf(track), AttributeKey::Preview);
+    removeNumbers(*nodeOf(track), AttributeKey::PreviewEvents);
 }
 
 void PreviewRecord::keepOn(IHostContext* context, const Track& track) const
 {
-    const core::Framerate framerate = m_framerate.value_or(core::Framerate());
-    std::vector<double> numbers{m_start, Layout, framerate.rate, static_cast<double>(flagsOf(framerate)),
-                                m_end.value_or(m_start - 1.0)};
-    numbers.insert(numbers.end(), m_numbers.begin(), m_numbers.end());
-    writeNumbers(context, *nodeOf(track), AttributeKey::Preview, numbers);
+    const Counted<IProjectNode> node = nodeOf(track);
+    if (m_numbers.empty())
+        removeNumbers(*node, AttributeKey::PreviewEvents);
+    else
+        writeNumbers(context, *node, AttributeKey::PreviewEvents, m_numbers);
+    const core::Framerate framerate = m_head.framerate.value_or(core::Framerate());
+    Numbers head{start(),
+                 ContentsLayout,
+                 framerate.rate,
+                 static_cast<double>(flagsOf(framerate)),
+                 end().value_or(start() - 1.0),
+                 checksumOf(m_numbers)};
+    head.push_back(checksumOf(head));
+    writeNumbers(context, *node, AttributeKey::Preview, head);
 }
 
 std::vector<PreviewRecord::Node> PreviewRecord::others(std::vector<Node> events) const
 {
     auto left = m_events;
     std::erase_if(events, [&](const Node& event) {
-        const auto found = left.find(contentOf(numbersOf(*event)));
+        const auto found = left.find(knownOf(numbersOf(*event)));
         return found != left.end() && found->second-- > 0;
     });
     return events;
 }
 
-PreviewRecord::Content PreviewRecord::contentOf(const std::array<double, 4>& event) const
+PreviewRecord::Event PreviewRecord::numbersOf(IProjectNode& event) const
 {
-    const auto [start, end, offset, name] = event;
-    if (m_hasPlacesAlone)
-        return {toInstant(start), toInstant(end), 0, 0};
-    return {toInstant(start), toInstant(end), toInstant(offset), std::llround(name)};
+    const std::uint32_t print = m_compared == Compared::Contents ? contentPrintOf(event) : namePrintOf(event);
+    return {event.getStart(nullptr), event.getEnd(nullptr), event.getSourceOffset(nullptr), static_cast<double>(print)};
 }
 
-void PreviewRecord::add(const std::array<double, 4>& event)
+PreviewRecord::Known PreviewRecord::knownOf(const Event& event) const
 {
-    ++m_events[contentOf(event)];
+    const auto [start, end, offset, print] = event;
+    if (m_compared == Compared::Places)
+        return {toInstant(start), toInstant(end), 0, 0};
+    return {toInstant(start), toInstant(end), toInstant(offset), std::llround(print)};
+}
+
+void PreviewRecord::add(const Event& event)
+{
+    ++m_events[knownOf(event)];
     m_numbers.insert(m_numbers.end(), event.begin(), event.end());
     reachTo(event[1]);
 }
 
+void PreviewRecord::add(const Numbers& events, std::size_t from)
+{
+    for (std::size_t index = from; index < events.size(); index += EventSize)
+        add(Event{events[index], events[index + 1], events[index + 2], events[index + 3]});
+}
+
 void PreviewRecord::reachTo(double time)
 {
-    m_end = std::max(m_end.value_or(time), time);
+    m_head.end = std::max(end().value_or(time), time);
+}
+
+bool PreviewRecord::isSound() const
+{
+    const bool isInOrder = m_events.empty() || m_events.begin()->first[0] >= toInstant(start()) - 1;
+    return isInOrder && isSoundHead(m_head);
 }
 
 std::vector<PreviewRecord::Node> eventsReachingInto(const Track& track, double start, double end)

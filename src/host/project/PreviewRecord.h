@@ -7,6 +7,7 @@
 #include "velmark/ProjectNode.h"
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <map>
 #include <optional>
@@ -21,55 +22,76 @@ namespace cadrel::host {
 class Track;
 
 /// What the system has written on one track in the preview stretch: for a preview, or in a run that has failed since. The
-/// track keeps it in an attribute, which follows the host's undo list and is stored with the project. Only what is written
+/// track keeps it in two attributes, which follow the host's undo list and are stored with the project. Only what is written
 /// down here is ever taken away again; all else in the stretch is the user's.
 ///
-/// Times are seconds from the time origin, and stay true when that moves. The numbers of the attribute are:
+/// Times are seconds from the time origin, and stay true when that moves. The numbers of the first attribute are:
 ///
-///     start, 1, frame rate, its flags, end      the end lies before the start where nothing is written
-///     start, end, source offset, name           of each event, the name as a number that is made of it
+///     start, 2, frame rate, its flags, end,     the end lies before the start where nothing is written
+///     checksum of the second one, checksum of these six
 ///
-/// or, in earlier projects, only the start, or the start and the end, followed by those of each event.
+/// and those of the second one, which isn't there where there are none:
+///
+///     start, end, source offset, content        of each event, the content as contentPrintOf gives it
+///
+/// In earlier projects one attribute has it all: after the start the number 1, rate, flags and end, followed by the events
+/// with their names alone, as namePrintOf gives them; or only the start, or the start and the end, followed by the start and
+/// end of each event.
 class PreviewRecord {
 public:
     using Node = Velmark::Counted<Velmark::IProjectNode>;
 
+    /// All but the events, which is read at little cost.
+    struct Head {
+        double start;
+        std::optional<double> end; ///< of the last event or automation point; nothing when nothing is written
+        std::optional<core::Framerate> framerate; ///< under which it was written; nothing where that isn't known
+    };
+
     /// Of all that stands on the track from `start` on; an unknown rate is kept as none.
     static PreviewRecord ofContent(const Track& track, double start, const core::Framerate& framerate);
-    /// The one that the track keeps; nothing for a track that keeps none, and for an attribute that makes no sense.
+    /// The one that the track keeps; nothing for a track that keeps none, and for attributes that make no sense or are
+    /// damaged.
     static std::optional<PreviewRecord> keptBy(const Track& track);
-    /// Whether the track has the attribute, whatever it says.
+    /// Also of a record whose events are damaged.
+    static std::optional<Head> headKeptBy(const Track& track);
+    /// Whether the track has the first attribute, whatever it says.
     static bool isKeptBy(const Track& track);
     /// Throws Result::HostCallFailed when the host refuses; so does keepOn.
     static void dropFrom(const Track& track);
     void keepOn(Velmark::IHostContext* context, const Track& track) const;
 
-    double start() const { return m_start; }
-    /// Of the last event or automation point; nothing when nothing is written.
-    std::optional<double> end() const { return m_end; }
-    /// Under which it was written; nothing where that isn't known.
-    std::optional<core::Framerate> framerate() const { return m_framerate; }
+    double start() const { return m_head.start; }
+    std::optional<double> end() const { return m_head.end; }
+    std::optional<core::Framerate> framerate() const { return m_head.framerate; }
     /// Those of the events that aren't written down here: they begin or end elsewhere, play from elsewhere in their clips, or
-    /// have another name. Nothing else of an event is compared, and of a record of earlier projects only the place.
+    /// have another name, clip or content. Nothing else of an event is compared, and of a record of earlier projects only the
+    /// place, or that and the name.
     std::vector<Node> others(std::vector<Node> events) const;
 
 private:
-    /// Of an event: where it begins and ends, how far into its clip it begins to play, in instants, and its name.
-    using Content = std::array<std::int64_t, 4>;
+    enum class Compared { Places, Names, Contents };
+    using Numbers = std::vector<double>;
+    /// Of an event, as it is stored.
+    using Event = std::array<double, 4>;
+    /// Of an event: where it begins and ends, how far into its clip it begins to play, in instants, and what it is made of.
+    using Known = std::array<std::int64_t, 4>;
+    struct StoredHead;
 
-    explicit PreviewRecord(double start) : m_start(start) {}
-    static std::optional<PreviewRecord> ofPlaces(const std::vector<double>& numbers);
-    static std::optional<PreviewRecord> ofNumbers(const std::vector<double>& numbers);
-    Content contentOf(const std::array<double, 4>& event) const;
-    void add(const std::array<double, 4>& event);
+    PreviewRecord(const Head& head, Compared compared) : m_head(head), m_compared(compared) {}
+    static std::optional<PreviewRecord> ofPlaces(const Numbers& numbers);
+    static std::optional<PreviewRecord> ofNames(const Numbers& numbers);
+    Event numbersOf(Velmark::IProjectNode& event) const;
+    Known knownOf(const Event& event) const;
+    void add(const Event& event);
+    void add(const Numbers& events, std::size_t from);
     void reachTo(double time);
+    bool isSound() const;
 
-    double m_start;
-    std::optional<double> m_end;
-    std::optional<core::Framerate> m_framerate;
-    bool m_hasPlacesAlone = false;
-    std::map<Content, std::int64_t> m_events; ///< and how many of them are there
-    std::vector<double> m_numbers;            ///< of each event, as they are stored
+    Head m_head;
+    Compared m_compared;
+    std::map<Known, std::int64_t> m_events; ///< and how many of them are there
+    Numbers m_numbers;                      ///< of each event, as they are stored
 };
 
 /// The events and parts of a track that lie in a stretch or reach into it, in seconds from the time origin.

@@ -283,8 +283,12 @@ void Project::rememberMemos()
 {
     // What is known of an earlier preview would be taken for edits of this one.
     m_memoSync.forget();
-    const Track& memos = markerTrack(TrackRole::Memos);
-    if (isPreviewing() && memos.isAlive())
+    if (!isPreviewing())
+        return;
+    m_memoSync.forgetCopies(m_previewEvents->events());
+    // An undo may have brought the track back.
+    Track& memos = markerTrack(TrackRole::Memos);
+    if (findTrack(memos, TypeWord::Marker, TrackRole::Memos))
         m_memoSync.remember(memos, previewed());
 }
 

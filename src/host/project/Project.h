@@ -155,7 +155,7 @@ public:
     // Work for the engine; in ProjectEdits.cpp.
 
     /// Writes the source of the cut's events to their destination in the preview stretch. What would stand before the time
-    /// origin is left out.
+    /// origin or 00:00:00:00 is left out.
     void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
     /// The numbers of the events of which processCut has left out something that is there, since startWriting. What a
     /// restricted run doesn't replace doesn't count.
@@ -189,13 +189,13 @@ public:
     /// out all, and throws the first failure at the end.
     void rememberWritten();
     /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
-    /// since stays, and so does what he has moved, renamed, slipped or given another length; a copy that he has changed in no
-    /// other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
+    /// since stays, and so does what he has moved, renamed, slipped or given another length, clip or content; a copy that he
+    /// has changed in no other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
     /// written.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces, in seconds of the project's clock: the range that the user restricts it to, or else the day that
-    /// timecodes can name.
+    /// timecodes can name. What is before that day stays in any case.
     void getApplyRange(double& start, double& end) const;
     /// Lets the host join the pieces that the cuts have left of one clip.
     void closeRange(bool onlySelected, double start, double end);
@@ -258,12 +258,11 @@ private:
     /// All that a run may change but these.
     std::vector<Track> tracksOfTheUser();
     /// What of a track's events in a stretch the system hasn't written, in seconds from the time origin.
-    std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
-                                                                     const core::SecondsRange& stretch);
-    /// Leaves out the copies that stand in a stretch of the preview: what the user has made of them is in their memos, which
-    /// stand before `start`, in seconds from the time origin. One that he has taken out of all stretches is his own.
-    void leaveOutFollowed(std::vector<Velmark::Counted<Velmark::IProjectNode>>& copies, const Track& memos,
-                          double start);
+    static std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
+                                                                            const core::SecondsRange& stretch);
+    /// Removes the copies that their memos have followed, wherever they stand: what the user has made of them is in their
+    /// memos, which stand before `start`, in seconds from the time origin. All others that he has edited are his own.
+    void removeFollowed(Velmark::IEditTransaction& transaction, double start);
     /// Removes the automation points in a stretch, in seconds from the time origin, where none follow. Emptying the stretch
     /// would leave one at its start, as the values of the system's own points are rounded. Where others follow, the curve
     /// needs it to go on before the stretch as it did.
@@ -288,17 +287,18 @@ private:
     // Edits.
     /// Selected, where the settings ask for selected tracks alone.
     bool isWanted(const Track& track) const;
-    /// The tracks whose material a run carries over, and the memos'.
-    std::vector<Track> carriedTracks();
-    /// The tracks on which a run may write, whose automation it leads over what nothing covers.
-    std::vector<Track> automatedTracks();
+    /// The tracks that a run or preview carries over, and all marker tracks. While one writes, they are those from its begin
+    /// but for what is locked since: on what the user selects or unlocks meanwhile, nothing is written that could replace
+    /// what is there.
+    std::vector<Track> conformedTracks();
+    /// Before which nothing is written, on the project's clock.
+    double earliestPlace() const;
     Velmark::Counted<Velmark::IObjectList> listOf(const std::vector<const Track*>& tracks) const;
     void copyRange(const std::vector<const Track*>& tracks, double start, double end, double destination);
     void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);
     void moveBack(Velmark::IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end);
-    /// Whether something stands on the tracks in the part of a source that would come to stand before the time origin.
-    bool hasBeforeOrigin(const std::vector<const Track*>& tracks, const core::SecondsRange& source,
-                         double destination) const;
+    /// Whether something stands on the tracks in the part of a source that would come to stand before the earliest place.
+    bool isLeftOut(const std::vector<const Track*>& tracks, const core::SecondsRange& source, double destination) const;
     void writeDestinationMarker(Velmark::IEditTransaction& transaction, const core::EventBase& event);
     void tick(std::uint64_t steps);
 
@@ -320,6 +320,7 @@ private:
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;
     std::vector<std::uint32_t> m_leftOutEvents;
+    std::optional<std::vector<Track>> m_tracksOfEdit; ///< from startWriting to rememberWritten
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;

@@ -68,6 +68,17 @@ std::optional<core::SecondsRange> writtenStretch(const std::vector<Track>& track
     return stretch;
 }
 
+/// The earliest; nothing when no track has written anything down.
+std::optional<double> writtenStart(const std::vector<Track>& tracks)
+{
+    std::optional<double> start;
+    for (const Track& track : tracks) {
+        if (const auto head = PreviewRecord::headKeptBy(track))
+            start = std::min(start.value_or(head->start), head->start);
+    }
+    return start;
+}
+
 std::vector<Node> pointsIn(IProjectNode& curve, const core::SecondsRange& stretch)
 {
     std::vector<Node> points = childrenOf(curve);
@@ -90,10 +101,13 @@ void Project::startWriting()
     ensurePreviewOffset();
     m_writingFrom = requiredOffset() - timeOrigin();
     m_leftOutEvents.clear();
+    m_tracksOfEdit.reset();
+    m_tracksOfEdit = conformedTracks();
 }
 
 void Project::rememberWritten()
 {
+    m_tracksOfEdit.reset();
     const std::optional<double> start = std::exchange(m_writingFrom, std::nullopt);
     if (!start)
         return;
@@ -117,6 +131,8 @@ void Project::clearPreview(IEditTransaction& transaction)
 {
     setTracksLocked(false);
     const std::vector<Track> tracks = cadrelTracks();
+    if (const auto start = writtenStart(tracks))
+        removeFollowed(transaction, *start);
     if (const auto stretch = writtenStretch(tracks)) {
         SparedContent spared(transaction);
         FirstFailure failure;
@@ -160,28 +176,27 @@ std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRa
     std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
     if (const auto record = PreviewRecord::keptBy(track))
         events = record->others(std::move(events));
-    findMarkerTracks();
-    if (track == markerTrack(TrackRole::Memos))
-        leaveOutFollowed(events, track, stretch.start);
     return events;
 }
 
-void Project::leaveOutFollowed(std::vector<Node>& copies, const Track& memos, double start)
+void Project::removeFollowed(IEditTransaction& transaction, double start)
 {
-    if (copies.empty() || !hasPreviewOffset())
-        return;
+    findMarkerTracks();
+    const Track& memos = markerTrack(TrackRole::Memos);
+    const double begin = start + timeOrigin();
     std::set<std::int64_t> ids;
-    for (const HostEvent& memo : memos.clipEvents()) {
-        if (isBefore(memo.getStart(), start + timeOrigin()))
+    std::vector<HostEvent> followed;
+    for (HostEvent& memo : memos.clipEvents()) {
+        if (!isBefore(memo.getEnd(), begin) && MemoSync::isFollowed(memo))
+            followed.push_back(std::move(memo));
+        else if (isBefore(memo.getStart(), begin))
             ids.insert(memo.getUserId());
     }
-    std::set<const IProjectNode*> adrift;
-    for (const HostEvent& memo : MemoSync::adrift(memos, previewed()))
-        adrift.insert(memo.node());
-    std::erase_if(copies, [&](const Node& event) {
-        const std::int64_t id = HostEvent(memos, event).getUserId();
-        return id > 0 && ids.contains(id) && !adrift.contains(event.get());
-    });
+    for (HostEvent& copy : followed) {
+        const std::int64_t id = copy.getUserId();
+        if (id > 0 && ids.contains(id))
+            copy.remove(transaction);
+    }
 }
 
 void Project::findPreviewedTracks()
@@ -199,9 +214,9 @@ MemoSync::Previewed Project::previewed()
     double written = offset - origin;
     std::optional<core::Framerate> framerate;
     for (const Track& track : cadrelTracks()) {
-        if (const auto record = PreviewRecord::keptBy(track)) {
-            written = record->start();
-            framerate = record->framerate();
+        if (const auto record = PreviewRecord::headKeptBy(track)) {
+            written = record->start;
+            framerate = record->framerate;
             break;
         }
     }

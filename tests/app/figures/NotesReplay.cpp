@@ -96,12 +96,38 @@ void NotesReplay::carryOutRow(const json& row, std::size_t reel)
 {
     if (row.at("row") == "kept") {
         check(intOf(row, "offsetFrames") == timeOf(row.at("newIn")) - timeOf(row.at("oldIn")), "offset of kept", row);
+    } else if (row.at("row") == "moved") {
+        lookAtMoveEnd(row, reel);
     } else {
         carryOut(row, reel);
         const int offset = static_cast<int>(m_tables[reel].size()) - m_before[reel];
         check(intOf(row, "offsetFrames") == offset, "offset is " + std::to_string(offset), row);
     }
     showRow(row, reel);
+}
+
+/// The other end of a step of a reel before this one. What has come stands there, and what has gone doesn't.
+void NotesReplay::lookAtMoveEnd(const json& row, std::size_t reel)
+{
+    ++m_moveEnds;
+    const bool isTarget = row.contains("fromReel");
+    const auto step = std::find_if(m_moveSteps.begin(), m_moveSteps.end(),
+                                   [&row](const json& move) { return move.at("number") == row.at("step"); });
+    check(step != m_moveSteps.end(), "the other end of no move", row);
+    if (step == m_moveSteps.end())
+        return;
+    const json& here = step->at(isTarget ? "at" : "from");
+    const json& there = step->at(isTarget ? "from" : "at");
+    check(placeIn(row.at("at")) == reel && here.at("reel") == row.at("at").at("reel") &&
+              there.at("reel") == row.at(isTarget ? "fromReel" : "toReel") &&
+              row.at("frames") == step->at("moveFrames"),
+          "the other end of another move", row);
+    check(intOf(row, "offsetFrames") == static_cast<int>(m_tables[reel].size()) - m_before[reel], "offset", row);
+    if (!isTarget)
+        return;
+    const int first = m_oldCut.frameAt(timeOf(step->at("changes").at(0).at("old").at("in")));
+    const Piece& piece = m_tables[reel].at(static_cast<std::size_t>(intOf(row.at("at"), "frame")));
+    check(!piece.isNew && piece.frame == first, "what is moved isn't at its other end", row);
 }
 
 void NotesReplay::carryOut(const json& step, std::size_t reel)
@@ -165,6 +191,8 @@ void NotesReplay::move(const json& step)
     check(intOf(step, "deleteFrames") == 0 && intOf(step, "insertFrames") == 0, "a move that deletes", step);
     const json& change = step.at("changes").at(0);
     m_moves.push_back(change);
+    if (step.at("at").at("reel") != step.at("from").at("reel"))
+        m_moveSteps.push_back(step);
     check(change.at("kind") == "moved" && intOf(change, "frames") == length &&
               intOf(change.at("old"), "frames") == length &&
               pieces.front().frame == m_oldCut.frameAt(timeOf(change.at("old").at("in"))),
@@ -185,10 +213,10 @@ void NotesReplay::lookAtChanges(const json& step)
         if (kind == "head-trimmed" || kind == "tail-trimmed") {
             lost += std::max(0, -frames);
             won += std::max(0, frames);
-        } else if (kind == "lifted" || kind == "replaced") {
+        } else if (kind == "lifted" || kind == "replaced" || kind == "unchanged") {
             lost += frames;
         }
-        if (kind == "inserted" || kind == "replaced" || kind == "doubled")
+        if (kind == "inserted" || kind == "replaced" || kind == "doubled" || kind == "unchanged")
             won += frames;
         // A shot that is retimed, or a transition, changes frames without a loss of its own.
         isSimple = isSimple && kind != "retimed" && !kind.starts_with("transition");
@@ -209,11 +237,11 @@ void NotesReplay::lookAtChange(const json& change, const json& step)
     const auto oldIn = [&change] { return timeOf(change.at("old").at("in")); };
     const auto newIn = [&change] { return timeOf(change.at("new").at("in")); };
     const std::string length = timecodeOfFrames(std::abs(frames));
-    if (kind == "lifted" || kind == "replaced")
+    if (kind == "lifted" || kind == "replaced" || kind == "unchanged")
         check(intOf(change.at("old"), "frames") == frames &&
                   isConsecutive(m_removed, m_oldCut.frameAt(oldIn()), frames),
               "what is lifted", step);
-    if (kind == "inserted" || kind == "replaced" || kind == "doubled")
+    if (kind == "inserted" || kind == "replaced" || kind == "doubled" || kind == "unchanged")
         check(intOf(change.at("new"), "frames") == frames &&
                   isConsecutive(m_inserted, m_newCut.frameAt(newIn()), frames),
               "what is inserted", step);
@@ -227,7 +255,15 @@ void NotesReplay::lookAtChange(const json& change, const json& step)
         m_phrases.push_back("replaced " + length);
         lookAtSource(change);
     } else if (kind == "moved") {
-        m_phrases.push_back("moved " + length + " at " + timecodeOfFrames(oldIn()));
+        m_phrases.push_back("moved " + length);
+        m_phrases.push_back("in the old cut at " + timecodeOfFrames(oldIn()));
+    } else if (kind == "unchanged") {
+        ++m_unchanged;
+        m_phrases.push_back("unchanged " + length);
+        for (int frame = 0; frame < frames; ++frame)
+            check(m_oldCut.at(m_oldCut.frameAt(oldIn()) + frame)
+                      .looksLike(m_newCut.at(m_newCut.frameAt(newIn()) + frame)),
+                  "what is unchanged", step);
     } else if (kind == "doubled") {
         m_doubledFrames += frames;
         for (int frame = 0; frame < frames; ++frame)
@@ -387,6 +423,7 @@ void NotesReplay::lookAtTotals()
     check(intOf(totals, "movedFrames") == m_movedFrames, "moved", totals);
     check(intOf(totals, "steps") == m_steps, "steps", totals);
     check(totals.at("reels") == m_tables.size(), "reels", totals);
+    check(m_moveEnds == static_cast<int>(m_moveSteps.size()), "other ends of moves", totals);
     check(m_notes.at("largest").get<std::vector<int>>() == largest(), "largest", m_notes.at("largest"));
     for (const auto& [side, cut] : {std::pair{"old", &m_oldCut}, std::pair{"new", &m_newCut}})
         check(m_notes.at(side).at("events") == cut->events().size() && m_notes.at(side).at("invalid") == 0,
@@ -412,6 +449,10 @@ void NotesReplay::showRow(const json& row, std::size_t reel)
     const std::string offset = signedTimecode(static_cast<int>(m_tables[reel].size()) - m_before[reel]);
     if (row.at("row") == "kept") {
         m_rows.push_back({row.at("newIn"), length("frames"), row.at("oldIn"), offset});
+        return;
+    }
+    if (row.at("row") == "moved") {
+        m_rows.push_back({row.at("at").at("timecode"), length("frames"), offset});
         return;
     }
     std::vector<std::string> times{row.at("at").at("timecode")};

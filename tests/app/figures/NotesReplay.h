@@ -32,6 +32,9 @@ public:
     const std::vector<std::vector<std::string>>& rows() const { return m_rows; }
     /// What the forms say of each change: "tail -24 frames", "lifted 00:00:01:10 at 01:03:18:00".
     const std::vector<std::string>& phrases() const { return m_phrases; }
+    /// How many moves between reels, and how many changes that change nothing, there are.
+    std::size_t movesBetweenReels() const { return m_moveSteps.size(); }
+    int unchanged() const { return m_unchanged; }
     /// The numbers of the largest steps.
     std::vector<int> largest() const;
 
@@ -47,6 +50,7 @@ private:
     int baseOf(std::size_t reel) const;
     std::size_t placeIn(const nlohmann::json& place);
     void carryOutRow(const nlohmann::json& row, std::size_t reel);
+    void lookAtMoveEnd(const nlohmann::json& row, std::size_t reel);
     void carryOut(const nlohmann::json& step, std::size_t reel);
     void replace(const nlohmann::json& step);
     void move(const nlohmann::json& step);
@@ -72,8 +76,11 @@ private:
     int m_doubledFrames = 0;
     int m_movedFrames = 0;
     int m_steps = 0;
-    std::vector<nlohmann::json> m_moves; ///< the changes of steps that move
-    std::map<int, int> m_extents;        ///< by the numbers of the steps
+    std::vector<nlohmann::json> m_moves;     ///< the changes of steps that move
+    std::vector<nlohmann::json> m_moveSteps; ///< that move between reels
+    int m_moveEnds = 0;                      ///< the rows of their other ends
+    int m_unchanged = 0;
+    std::map<int, int> m_extents; ///< by the numbers of the steps
     std::vector<std::string> m_faults;
     std::vector<std::vector<std::string>> m_rows;
     std::vector<std::string> m_phrases;

@@ -1,12 +1,15 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "tests/app/Film.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/page/Browser.h"
 #include "tests/support/TreePaths.h"
 
+#include <algorithm>
 #include <gtest/gtest.h>
 #include <memory>
 #include <nlohmann/json.hpp>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -18,17 +21,18 @@ using nlohmann::json;
 /// What the tests ask of the page.
 constexpr const char* Helpers = R"(
   const all = selector => [...document.querySelectorAll(selector)];
+  const marksFor = id => all(`svg [data-rows~="${id}"]`);
   const shownRows = kind => all('tr[id]').filter(row => !row.hidden && row.dataset.kinds.split(' ').includes(kind)).length;
   // Where a click meets a mark of that line in the picture; null where it is thinner than a pixel.
   function pointOf(id) {
     const box = svg.getBoundingClientRect();
-    for (const mark of all(`svg [data-step="${id}"]`)) {
+    for (const mark of marksFor(id)) {
       const own = mark.getBoundingClientRect();
       const left = Math.max(own.left, box.left), right = Math.min(own.right, box.right);
       for (let line = 1; line < 12; ++line) {
         const y = own.top + own.height * line / 12;
         for (let x = Math.ceil(left); x < right; x += Math.max(1, Math.floor((right - left) / 9)))
-          if (document.elementFromPoint(x, y)?.dataset?.step === id) return { x, y };
+          if (document.elementFromPoint(x, y)?.dataset?.rows?.split(' ').includes(id)) return { x, y };
       }
     }
     return null;
@@ -37,7 +41,7 @@ constexpr const char* Helpers = R"(
   function enlarge(id) {
     scrollTo(0, 0);
     zoom(1e9);
-    const box = document.querySelector(`svg [data-step="${id}"]`).getBBox();
+    const box = marksFor(id)[0].getBBox();
     while (!pointOf(id) && width > whole / 1000) zoom(0.5, box.x + box.width / 2);
   }
   function luminance(rgb) {
@@ -106,8 +110,36 @@ protected:
     {
         browser.prefer("light");
         browser.resize(1240, 900);
-        browser.open(s_page);
+        show(s_page);
+    }
+
+    void show(const std::filesystem::path& page)
+    {
+        browser.open(page);
         browser.valueOf(Helpers);
+    }
+
+    /// The page of two cuts of a film, which are given as the lines of their EDLs.
+    static std::filesystem::path pageOf(const std::string& oldCut, const std::string& newCut)
+    {
+        const std::string page = *s_folder / "other.html";
+        const Outcome outcome =
+            runCadrel({"notes", "--old", s_folder->write("old.edl", oldCut), "--new",
+                       s_folder->write("new.edl", newCut), "--rate", "24 fps", "-o", page, "--overwrite"});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return page;
+    }
+
+    /// The notes of the example with what became of its sound.
+    static std::filesystem::path pageWithSound()
+    {
+        const std::string page = *s_folder / "sound.html";
+        const Outcome outcome =
+            runCadrel({"apply", treePath("examples/reel3/reel3.stage"), "--old",
+                       treePath("examples/reel3/reel3_v07.edl"), "--new", treePath("examples/reel3/reel3_v12.edl"),
+                       "--vfx", "VFX_****_v,_comp", "--notes", page, "--overwrite", "--summary"});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return page;
     }
 
     void TearDown() override
@@ -137,15 +169,21 @@ protected:
         }
         throw std::runtime_error("the Tab key doesn't reach " + selector);
     }
+    /// Clicks on a mark of a line until the line is marked; a mark of several lines leads to one after the other.
     bool clickOn(const std::string& id)
     {
-        browser.valueOf("scrollTo(0, 0)");
-        const json point = browser.valueOf("pointOf('" + id + "')");
-        if (point.is_null())
-            return false;
-        browser.click(point.at("x"), point.at("y"));
+        for (int click = 0; click < MostLinesOfAMark; ++click) {
+            browser.valueOf("scrollTo(0, 0)");
+            const json point = browser.valueOf("pointOf('" + id + "')");
+            if (point.is_null())
+                return false;
+            browser.click(point.at("x"), point.at("y"));
+            if (markedLine() == id)
+                break;
+        }
         return true;
     }
+    static constexpr int MostLinesOfAMark = 3;
 
     static std::unique_ptr<TempFolder> s_folder;
     static std::filesystem::path s_page;
@@ -199,24 +237,191 @@ TEST_F(NotesPage, IsLightOrDarkAsTheUserHasIt)
 TEST_F(NotesPage, AClickOnABandLeadsToItsLine)
 {
     int clicked = 0;
-    for (const std::string id : browser.valueOf("[...new Set(all('svg [data-step]').map(e => e.dataset.step))]")) {
+    for (const std::string id : browser.valueOf("rows.map(row => row.id)")) {
         if (!clickOn(id))
             continue;
         ++clicked;
         EXPECT_EQ(markedLine(), id);
         EXPECT_TRUE(isInView(id)) << id;
-        EXPECT_GE(count("all('svg [data-step=\"" + id + "\"].on').length"), 1) << id;
+        EXPECT_GE(count("marksFor('" + id + "').filter(mark => mark.classList.contains('on')).length"), 1) << id;
     }
     EXPECT_GT(clicked, 60);
 }
 
-TEST_F(NotesPage, EveryStepHasAMarkThatCanBeClickedOnceItIsLargeEnough)
+TEST_F(NotesPage, EveryLineLeadsToItsMarksAndBack)
 {
-    for (const std::string id :
-         browser.valueOf("rows.filter(row => !row.classList.contains('k')).map(row => row.id)")) {
+    for (const std::string id : browser.valueOf("rows.map(row => row.id)")) {
+        browser.valueOf("document.getElementById('" + id + "').click()");
+        EXPECT_EQ(markedLine(), id);
+        const json marked = browser.valueOf("all('svg .on').map(mark => mark.dataset.rows.split(' '))");
+        EXPECT_GE(marked.size(), 1U) << id;
+        for (const json& lines : marked)
+            EXPECT_NE(std::find(lines.begin(), lines.end(), id), lines.end()) << id;
+
+        browser.valueOf("choose('')");
         browser.valueOf("enlarge('" + id + "')");
         ASSERT_TRUE(clickOn(id)) << id;
         EXPECT_EQ(markedLine(), id);
+        EXPECT_TRUE(isInView(id)) << id;
+    }
+}
+
+/// Two reels; with `isMoved` the second shot of the first has gone to the end of the second.
+std::string twoReels(bool isMoved)
+{
+    const std::string moved =
+        cut("002", "MOVED", "10:00:00:00 10:00:10:00", isMoved ? "02:00:20:00 02:00:30:00" : "01:00:20:00 01:00:30:00");
+    return cut("001", "ONE", "10:00:00:00 10:00:20:00", "01:00:00:00 01:00:20:00") + (isMoved ? "" : moved) +
+           cut("003", "TWO", "10:00:00:00 10:00:20:00", "02:00:00:00 02:00:20:00") + (isMoved ? moved : "");
+}
+
+TEST_F(NotesPage, AMoveBetweenReelsIsToldInBothOfThem)
+{
+    show(pageOf(twoReels(false), twoReels(true)));
+
+    EXPECT_EQ(browser.valueOf("document.getElementById('m2-1').innerText.replace(/\\s+/g, ' ').trim()"),
+              "02:00:20:00 moved 00:00:10:00 from reel 1, step 1 step 1: MOVED +00:00:10:00");
+    EXPECT_EQ(browser.valueOf("marksFor('m2-1').every(mark => mark.dataset.rows === 's1 m2-1 k2-2')"), true);
+    for (const std::string id : {"s1", "m2-1", "k2-2", "k1-1", "k2-1"}) {
+        EXPECT_TRUE(clickOn(id)) << id;
+        EXPECT_EQ(markedLine(), id);
+    }
+
+    browser.valueOf("document.querySelector('#m2-1 a').click()");
+    EXPECT_EQ(markedLine(), "s1");
+    // It is no step of its own.
+    browser.press("n");
+    EXPECT_EQ(markedLine(), "s1");
+    EXPECT_EQ(count("shownRows('moved')"), 2);
+}
+
+TEST_F(NotesPage, OnlyAReelWhereNothingHasChangedIsGrey)
+{
+    const std::string grey = "all('.overview tbody tr').map(row => row.classList.contains('k'))";
+
+    show(pageOf(twoReels(false), twoReels(true)));
+    EXPECT_EQ(browser.valueOf(grey), json({false, false}));
+    show(pageOf(twoReels(true), twoReels(true)));
+    EXPECT_EQ(browser.valueOf(grey), json({true, true}));
+}
+
+TEST_F(NotesPage, AMarkOfOneFrameInALongFilmIsAPixelWide)
+{
+    // A frame of two hours is a 150th of a pixel.
+    const std::string start = cut("001", "ONE", "10:00:00:00 11:00:00:00", "01:00:00:00 02:00:00:00");
+    show(pageOf(start + cut("002", "ONE", "11:00:00:00 12:00:00:00", "02:00:00:00 03:00:00:00"),
+                start + cut("002", "NEW", "10:00:00:00 10:00:00:01", "02:00:00:00 02:00:00:01") +
+                    cut("003", "ONE", "11:00:00:01 12:00:00:00", "02:00:00:01 03:00:00:00")));
+
+    ASSERT_EQ(count("marksFor('s1').length"), 2);
+    for (int mark = 0; mark < 2; ++mark) {
+        const std::string self = "marksFor('s1')[" + std::to_string(mark) + "]";
+        const std::string box = self + ".getBoundingClientRect()";
+        const std::string middle = "(b => [b.left + b.width / 2, b.top + b.height / 2])(" + box + ")";
+        EXPECT_LT(browser.valueOf(box + ".width"), 0.1);
+        for (const std::string aside : {"-0.4", "0", "0.4"})
+            EXPECT_EQ(browser.valueOf("(([x, y]) => document.elementFromPoint(x + " + aside + ", y) === " + self +
+                                      ")(" + middle + ")"),
+                      true)
+                << aside;
+        EXPECT_EQ(browser.valueOf("getComputedStyle(" + self + ").stroke"),
+                  browser.valueOf("getComputedStyle(" + self + ").fill"));
+    }
+}
+
+TEST_F(NotesPage, TheBoxesHaveTheHuesOfThePicture)
+{
+    for (const char* const scheme : {"light", "dark"}) {
+        browser.prefer(scheme);
+        const json kinds = browser.valueOf("boxes.map(box => box.value)");
+        EXPECT_EQ(browser.valueOf("boxes.filter(box => !marks.some(mark => mark.classList.contains(box.value)))"
+                                  ".map(box => box.value)"),
+                  json::array());
+        std::set<std::string> hues;
+        for (const std::string kind : kinds) {
+            const std::string hue =
+                browser.valueOf("getComputedStyle(document.querySelector('.tools ." + kind + "')).backgroundColor");
+            EXPECT_EQ(
+                browser.valueOf("[...new Set(all('svg ." + kind + "').map(mark => getComputedStyle(mark).fill))]"),
+                json({hue}))
+                << kind;
+            hues.insert(hue);
+        }
+        EXPECT_EQ(hues.size(), kinds.size());
+    }
+}
+
+TEST_F(NotesPage, TheMarksOfAStepTellOfItsChangesInTheirHues)
+{
+    // ONE loses its tail, TWO is replaced by a longer one, and THREE is replaced by one of its length.
+    show(pageOf(cut("001", "ONE", "10:00:00:00 10:00:20:00", "01:00:00:00 01:00:20:00") +
+                    cut("002", "TWO", "10:00:00:00 10:00:10:00", "01:00:20:00 01:00:30:00") +
+                    cut("003", "FOUR", "10:00:00:00 10:00:10:00", "01:00:30:00 01:00:40:00") +
+                    cut("004", "THREE", "10:00:00:00 10:00:05:00", "01:00:40:00 01:00:45:00"),
+                cut("001", "ONE", "10:00:00:00 10:00:15:00", "01:00:00:00 01:00:15:00") +
+                    cut("002", "NEW", "10:00:00:00 10:00:11:00", "01:00:15:00 01:00:26:00") +
+                    cut("003", "FOUR", "10:00:00:00 10:00:10:00", "01:00:26:00 01:00:36:00") +
+                    cut("004", "OTHER", "10:00:00:00 10:00:05:00", "01:00:36:00 01:00:41:00")));
+
+    // The kind that is on top at a place of a strip, in seconds.
+    const auto kindAt = [&](double second, bool isOld) -> std::string {
+        return browser.valueOf("(box => document.elementFromPoint(box.left + box.width * " + std::to_string(second) +
+                               " / 45, box." + (isOld ? "top + 5" : "bottom - 5") +
+                               ").classList[0] ?? 'nothing')(svg.getBoundingClientRect())");
+    };
+    EXPECT_EQ(kindAt(10, true), "kept");
+    EXPECT_EQ(kindAt(17, true), "trimmed");
+    EXPECT_EQ(kindAt(25, true), "lifted");
+    EXPECT_EQ(kindAt(42, true), "replaced");
+    EXPECT_EQ(kindAt(20, false), "inserted");
+    EXPECT_EQ(kindAt(38, false), "replaced");
+    EXPECT_EQ(kindAt(43, false), "nothing");
+}
+
+TEST_F(NotesPage, OneButtonUnfoldsAllSoundAndFoldsItAgain)
+{
+    show(pageWithSound());
+    const std::string open = "sounds.filter(sound => sound.open).length";
+    const int all = count("sounds.length");
+    ASSERT_GT(all, 20);
+    EXPECT_EQ(count(open), 0);
+
+    tabTo("[data-sound]");
+    browser.press("Enter");
+    EXPECT_EQ(count(open), all);
+    EXPECT_TRUE(browser.valueOf("sounds.every(sound => sound.querySelector('li').checkVisibility())"));
+    // Where one is folded, it unfolds all.
+    browser.valueOf("sounds[3].open = false");
+    browser.press("Enter");
+    EXPECT_EQ(count(open), all);
+    browser.press("Space");
+    EXPECT_EQ(count(open), 0);
+}
+
+TEST_F(NotesPage, PaperShowsAllSoundAndTheScreenIsAsItWasAfterwards)
+{
+    show(pageWithSound());
+    browser.valueOf("sounds[1].open = true");
+    browser.valueOf("window.seen = []; addEventListener('beforeprint', () => seen.push(sounds.every(s => s.open)));");
+
+    browser.printed();
+
+    EXPECT_EQ(browser.valueOf("seen"), json({true}));
+    EXPECT_EQ(browser.valueOf("sounds.map((s, i) => s.open ? i : -1).filter(i => i >= 0)"), json({1}));
+
+    // The preview may begin anew before it ends.
+    browser.valueOf("for (const name of ['beforeprint', 'beforeprint', 'afterprint']) dispatchEvent(new Event(name))");
+    EXPECT_EQ(browser.valueOf("sounds.map((s, i) => s.open ? i : -1).filter(i => i >= 0)"), json({1}));
+}
+
+TEST_F(NotesPage, ThePageWithSoundIsAsEasyToRead)
+{
+    show(pageWithSound());
+    browser.valueOf("unfold(true)");
+
+    for (const char* const scheme : {"light", "dark"}) {
+        browser.prefer(scheme);
+        EXPECT_EQ(browser.valueOf("faintTexts()"), json::array());
     }
 }
 
@@ -304,7 +509,7 @@ TEST_F(NotesPage, TheFilterShowsTheChosenKindsInTheTableAndInThePicture)
 {
     const int moves = count("shownRows('moved')");
     ASSERT_EQ(moves, 2);
-    const std::string bands = "all('svg .moved[data-step]').filter(e => getComputedStyle(e).display !== 'none').length";
+    const std::string bands = "all('svg .moved').filter(e => getComputedStyle(e).display !== 'none').length";
     ASSERT_GT(count(bands), 0);
 
     tabTo(".tools input[value=\"moved\"]");

@@ -96,9 +96,9 @@ public:
 /// "delete 5 at 10: TailTrimmed -5" of each step.
 std::string textOf(const PictureChange& change)
 {
-    static const char* const Words[] = {"head",     "tail",          "lifted",         "inserted",
-                                        "replaced", "moved",         "doubled",        "retimed",
-                                        "version",  "transition in", "transition out", "transition"};
+    static const char* const Words[] = {"head",           "tail",       "lifted",   "inserted", "replaced",
+                                        "moved",          "doubled",    "retimed",  "version",  "transition in",
+                                        "transition out", "transition", "unchanged"};
     return std::string(Words[static_cast<int>(change.kind)]) + " " + std::to_string(change.frames);
 }
 
@@ -386,8 +386,38 @@ TEST_F(ChangeNotesTest, TrimsThatCancelOutWithinSoManyFramesAreOneStep)
 
     EXPECT_EQ(Notes(oldCut, newCut, 39).steps().size(), 2U);
     const Notes film(oldCut, newCut, 40);
-    EXPECT_EQ(textOf(film.steps()), Texts{"-45 +45 at 95: tail -5; head 5;"});
+    EXPECT_EQ(textOf(film.steps()), Texts{"-45 +45 at 95: tail -5; unchanged 40; head 5;"});
     EXPECT_EQ(film.notes.joinedSteps(), 2U);
+}
+
+TEST_F(ChangeNotesTest, AJoinedStepNamesWhatItReplacesByItself)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 40}, {"C", 7, 10}, {"D", 10, 50}}),
+                     reelOf({{"A", 0, 95}, {"B", 0, 40}, {"C", 7, 10}, {"D", 5, 55}}), 50);
+
+    const PictureChange unchanged = film.steps().at(0).changes.at(1);
+    EXPECT_EQ(unchanged.kind, ChangeKind::Unchanged);
+    EXPECT_EQ(unchanged.shots, 2);
+    EXPECT_EQ(unchanged.oldShot->rollName(), "B");
+    EXPECT_EQ(unchanged.newShot->rollName(), "B");
+    EXPECT_EQ(unchanged.inOld, (FrameSpan{100, 50}));
+    EXPECT_EQ(unchanged.inNew, (FrameSpan{95, 50}));
+}
+
+TEST_F(ChangeNotesTest, TheTotalsOfJoinedTrimsAreThoseOfTheirStep)
+{
+    const EventList oldCut = reelOf({{"A", 0, 100}, {"B", 0, 40}, {"C", 10, 50}});
+    const EventList newCut = reelOf({{"A", 0, 95}, {"B", 0, 40}, {"C", 5, 55}});
+    const NoteTotals apart = Notes(oldCut, newCut, 39).notes.totals();
+    const NoteTotals joined = Notes(oldCut, newCut, 40).notes.totals();
+
+    EXPECT_EQ(apart.kept, 185);
+    EXPECT_EQ(apart.lifted, 5);
+    EXPECT_EQ(apart.inserted, 5);
+    EXPECT_EQ(joined.kept, 145);
+    EXPECT_EQ(joined.lifted, 45);
+    EXPECT_EQ(joined.inserted, 45);
+    EXPECT_EQ(joined.steps, 1U);
 }
 
 TEST_F(ChangeNotesTest, TrimsThatLeaveAFrameAreNotJoined)
@@ -437,6 +467,67 @@ TEST_F(ChangeNotesTest, AShotThatGoesToAnotherReelIsTakenOutOfItsOwn)
     EXPECT_EQ(steps[0].place, (WorkPlace{1, 100}));
     EXPECT_EQ(film.notes.reels()[0].entries.back().runningOffset, -20);
     EXPECT_EQ(film.notes.reels()[1].entries.back().runningOffset, 20);
+
+    // The other reel tells of it, too.
+    ASSERT_EQ(film.notes.reels()[1].entries.size(), 3U);
+    const NoteEntry& entry = film.notes.reels()[1].entries[1];
+    const MoveEnd* const end = entry.moveEnd();
+    ASSERT_NE(end, nullptr);
+    EXPECT_EQ(end->place, (WorkPlace{1, 100}));
+    EXPECT_TRUE(end->isTarget);
+    EXPECT_EQ(end->otherReel, 0U);
+    EXPECT_EQ(end->step, 1U);
+    EXPECT_EQ(end->move.frames, 20);
+    EXPECT_EQ(entry.number, 0U);
+    EXPECT_EQ(entry.lengthChange, 0);
+    EXPECT_EQ(entry.runningOffset, 20);
+}
+
+TEST_F(ChangeNotesTest, AReelThatGivesAShotToAnEarlierOneTellsOfIt)
+{
+    EventList oldCut = reelOf({{"A", 0, 100}});
+    oldCut.append(reelOf({{"B", 0, 100}, {"M", 0, 20}, {"C", 0, 50}}, 2 * Hour));
+    EventList newCut = reelOf({{"A", 0, 100}, {"M", 0, 20}});
+    newCut.append(reelOf({{"B", 0, 100}, {"C", 0, 50}}, 2 * Hour));
+    const Notes film(oldCut, newCut);
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"20 from 100 at 100: moved 20;"});
+    ASSERT_EQ(film.notes.reels()[1].entries.size(), 3U);
+    const MoveEnd* const end = film.notes.reels()[1].entries[1].moveEnd();
+    ASSERT_NE(end, nullptr);
+    EXPECT_EQ(end->place, (WorkPlace{1, 100}));
+    EXPECT_FALSE(end->isTarget);
+    EXPECT_EQ(end->otherReel, 0U);
+    EXPECT_EQ(end->step, 1U);
+    EXPECT_EQ(film.notes.reels()[1].entries[0].runningOffset, -20);
+    EXPECT_FALSE(film.notes.reels()[0].isUnchanged());
+    EXPECT_FALSE(film.notes.reels()[1].isUnchanged());
+}
+
+TEST_F(ChangeNotesTest, AReelThatGivesAsMuchAsItGetsHasChanged)
+{
+    EventList oldCut = reelOf({{"A", 0, 100}, {"M", 0, 20}});
+    oldCut.append(reelOf({{"N", 0, 20}, {"B", 0, 100}}, 2 * Hour));
+    EventList newCut = reelOf({{"A", 0, 100}, {"N", 0, 20}});
+    newCut.append(reelOf({{"M", 0, 20}, {"B", 0, 100}}, 2 * Hour));
+    const Notes film(oldCut, newCut);
+
+    const ReelNotes& other = film.notes.reels()[1];
+    EXPECT_EQ(other.before, other.after);
+    EXPECT_TRUE(std::none_of(other.entries.begin(), other.entries.end(),
+                             [](const NoteEntry& entry) { return entry.step() != nullptr; }));
+    EXPECT_FALSE(other.isUnchanged());
+    EXPECT_TRUE(Notes(oldCut, oldCut).notes.reels()[1].isUnchanged());
+}
+
+TEST_F(ChangeNotesTest, AMoveWithinAReelHasNoOtherEnd)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 30}, {"C", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"C", 0, 50}, {"B", 0, 30}}));
+
+    ASSERT_EQ(film.steps().size(), 1U);
+    for (const NoteEntry& entry : film.notes.reels()[0].entries)
+        EXPECT_EQ(entry.moveEnd(), nullptr);
 }
 
 TEST_F(ChangeNotesTest, TheTotalsAreThoseOfTheSteps)

@@ -2,6 +2,7 @@
 
 #include "core/notes/ChangeNotes.h"
 #include "core/notes/KeptStretches.h"
+#include "core/notes/StepChanges.h"
 #include "core/notes/StepMaker.h"
 #include "tests/core/notes/NotesPlayer.h"
 #include "tests/core/notes/RandomRecut.h"
@@ -29,7 +30,7 @@ StepList stepsBetween(const EventList& oldCut, const EventList& newCut, const Pi
     const Programme newProgramme(newCut, rules, numbers);
     StepList list = makeSteps(oldProgramme, newProgramme, findKeptStretches(oldProgramme, newProgramme));
     for (auto& rows : list.rows)
-        joinTrims(rows, simplify);
+        joinTrims(rows, simplify, StepChanges(oldProgramme, newProgramme));
     return list;
 }
 
@@ -42,15 +43,39 @@ std::size_t countSteps(const StepList& list)
     return count;
 }
 
+/// Whether the picture of a move between reels stands at its other end, or, of a place that it has gone from, is in the other
+/// reel by then.
+bool isToldRightly(const MoveEnd& end, const std::vector<NoteStep>& movesSoFar, const NotesPlayer& player)
+{
+    const auto move = std::find_if(movesSoFar.begin(), movesSoFar.end(), [&end](const NoteStep& step) {
+        return step.changes.front().inOld == end.move.inOld;
+    });
+    if (move == movesSoFar.end() || end.move.inNew != move->changes.front().inNew)
+        return false;
+    if (!end.isTarget)
+        return move->from.reel == end.place.reel && move->place.reel == end.otherReel;
+    return move->place.reel == end.place.reel && move->from.reel == end.otherReel &&
+           player.showsAt(end.place, end.move.inNew->start);
+}
+
 /// Carries all steps out. Empty when that gives the new cut, and when each step is told about; else what is wrong.
 std::string playAll(const EventList& oldCut, const EventList& newCut, const PictureRules& rules, const StepList& list)
 {
     NotesPlayer player(oldCut, newCut, rules, list.reels);
+    std::vector<NoteStep> moves; // between reels
+    std::size_t ends = 0;
     for (const auto& rows : list.rows) {
         for (const NoteRow& row : rows) {
+            if (const auto* const end = std::get_if<MoveEnd>(&row)) {
+                ++ends;
+                if (!isToldRightly(*end, moves, player))
+                    return "the other end of a move is wrong";
+            }
             const auto* const step = std::get_if<NoteStep>(&row);
             if (step == nullptr)
                 continue;
+            if (step->action == StepAction::Move && step->from.reel != step->place.reel)
+                moves.push_back(*step);
             if (step->changes.empty())
                 return "a step tells of no change";
             if (step->action == StepAction::Replace && !player.isDoneBefore(step->place))
@@ -64,7 +89,7 @@ std::string playAll(const EventList& oldCut, const EventList& newCut, const Pict
             player.carryOut(*step);
         }
     }
-    return player.difference();
+    return ends == moves.size() ? player.difference() : "a move between reels has no other end, or two";
 }
 
 RC_GTEST_PROP(NotesLaw, TheStepsTurnTheOldCutIntoTheNewOne, ())
@@ -105,13 +130,40 @@ RC_GTEST_PROP(NotesLaw, ACutHasNoStepsToItself, ())
     RC_ASSERT(countSteps(stepsBetween(film.newCut, film.newCut, film.rules)) == 0U);
 }
 
-RC_GTEST_PROP(NotesLaw, TheOffsetsEndInTheChangeOfLength, ())
+RC_GTEST_PROP(NotesLaw, TheTotalsAreThoseOfTheSteps, ())
 {
     const auto seed = *genRecutSeed();
+    const int simplify = *rc::gen::inRange(0, 400);
     const RandomRecut film(seed);
     const TestProject project(film.rules.framerate);
 
-    const ChangeNotes notes(film.oldCut, film.newCut, film.rules);
+    const ChangeNotes notes(film.oldCut, film.newCut, film.rules, simplify);
+
+    NoteTotals sum;
+    for (const ReelNotes& reel : notes.reels()) {
+        for (const NoteEntry& entry : reel.entries) {
+            if (const NoteStep* const step = entry.step()) {
+                ++sum.steps;
+                sum.lifted += step->removed;
+                sum.inserted += step->action == StepAction::Replace ? step->inserted.length : 0;
+                sum.moved += step->moved;
+            }
+        }
+    }
+    RC_ASSERT(notes.totals().steps == sum.steps);
+    RC_ASSERT(notes.totals().lifted == sum.lifted);
+    RC_ASSERT(notes.totals().inserted + notes.totals().doubled == sum.inserted);
+    RC_ASSERT(notes.totals().moved == sum.moved);
+}
+
+RC_GTEST_PROP(NotesLaw, TheOffsetsEndInTheChangeOfLength, ())
+{
+    const auto seed = *genRecutSeed();
+    const int simplify = *rc::gen::inRange(0, 400);
+    const RandomRecut film(seed);
+    const TestProject project(film.rules.framerate);
+
+    const ChangeNotes notes(film.oldCut, film.newCut, film.rules, simplify);
 
     const NoteTotals& totals = notes.totals();
     RC_ASSERT(totals.kept + totals.lifted == totals.before);
@@ -186,7 +238,44 @@ TEST(NotesOfRealEdls, EachEdlBecomesARecutOfItself)
         for (std::uint64_t seed = 1; seed <= 5; ++seed) {
             const EventList recut = recutOf(events, rules.framerate, seed);
 
-            EXPECT_EQ(playAll(events, recut, rules, stepsBetween(events, recut, rules)), "") << file << ", " << seed;
+            for (const int simplify : {0, 100})
+                EXPECT_EQ(playAll(events, recut, rules, stepsBetween(events, recut, rules, simplify)), "")
+                    << file << ", " << seed << ", " << simplify;
+        }
+    }
+}
+
+/// The example of two reels at its own rate, by the names of its clips.
+class NotesOfTwoReels : public testing::Test {
+protected:
+    const TestProject project{Framerate(24, 0)};
+    const PictureRules rules{project.framerate, MatchBy::ClipName, {}};
+    const EventList oldCut = loaded(treePath("examples/tworeels/old.edl"));
+    const EventList newCut = loaded(treePath("examples/tworeels/new.edl"));
+};
+
+TEST_F(NotesOfTwoReels, EachCutBecomesTheOther)
+{
+    const StepList there = stepsBetween(oldCut, newCut, rules);
+
+    EXPECT_EQ(playAll(oldCut, newCut, rules, there), "");
+    EXPECT_EQ(playAll(newCut, oldCut, rules, stepsBetween(newCut, oldCut, rules)), "");
+    // GULL comes in, and DOOR loses its start; else nothing has changed in either reel.
+    ASSERT_EQ(there.rows.size(), 2U);
+    EXPECT_EQ(there.rows[0].size(), 3U);
+    EXPECT_EQ(there.rows[1].size(), 3U);
+    EXPECT_EQ(countSteps(there), 2U);
+}
+
+TEST_F(NotesOfTwoReels, EachCutBecomesARecutOfItself)
+{
+    for (const EventList* const cut : {&oldCut, &newCut}) {
+        EXPECT_EQ(countSteps(stepsBetween(*cut, *cut, rules)), 0U);
+        for (std::uint64_t seed = 1; seed <= 50; ++seed) {
+            const EventList recut = recutOf(*cut, rules.framerate, seed);
+            for (const int simplify : {0, 100})
+                EXPECT_EQ(playAll(*cut, recut, rules, stepsBetween(*cut, recut, rules, simplify)), "")
+                    << seed << ", " << simplify;
         }
     }
 }

@@ -132,7 +132,7 @@ TEST(SoundNotes, TellsEachChangeAtTheStepThatCausesIt)
                      {SoundChangeKind::Split, 1, "river", {}, false, at(25, 35), at(32, 32), {}},
                      {SoundChangeKind::Doubled, 0, "far away", {}, false, at(1, 2), {}, at(3, 4)},
                      {SoundChangeKind::FellOut, 0, "step", {}, false, at(18, 19), at(18, 19), {}}};
-    facts.jumps = {{at(17, 17), "FX"}, {at(32, 32), "DIA"}};
+    facts.jumps = {{at(17, 17), {"FX"}}, {at(32, 32), {"DIA", "FX"}}};
 
     const SoundNotes sound(recut.notes, facts);
 
@@ -147,7 +147,7 @@ TEST(SoundNotes, TellsEachChangeAtTheStepThatCausesIt)
     ASSERT_EQ(sound.elsewhere().changes.size(), 1U);
     EXPECT_EQ(sound.elsewhere().changes[0].name, "far away");
     ASSERT_EQ(sound.at(1).jumps.size(), 1U);
-    EXPECT_EQ(sound.at(1).jumps[0].where, "FX");
+    EXPECT_EQ(sound.at(1).jumps[0].tracks, std::vector<std::string>{"FX"});
     ASSERT_EQ(sound.at(2).jumps.size(), 1U);
     EXPECT_TRUE(sound.elsewhere().jumps.empty());
 }

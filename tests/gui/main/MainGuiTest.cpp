@@ -1044,6 +1044,56 @@ TEST_F(MainGuiTest, ClosesTheChoiceOfVideosWhenTheProjectGoes)
     EXPECT_EQ(m_alerts.messages, Texts());
 }
 
+// ---- Settings ------------------------------------------------------------------------------------------------------
+
+TEST_F(MainGuiTest, OpensTheSettings)
+{
+    activate();
+    EXPECT_TRUE(settingsDialog().isEnabled());
+    click("Settings Button");
+    EXPECT_TRUE(settingsDialog().isVisible());
+    EXPECT_FALSE(controls().isEnabled());
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_FALSE(settingsDialog().isVisible());
+    EXPECT_TRUE(controls().isEnabled());
+}
+
+TEST_F(MainGuiTest, MarksVfxShotsAtOnceWhenTheSettingsClose)
+{
+    fill(ListKind::Old, 1);
+    activate();
+    click("Settings Button");
+    m_model.settings().setVfxPattern({"A00", "", true}, 0);
+    EXPECT_FALSE(list(ListKind::Old).at(0).vfx());
+    m_window.press(juce::KeyPress::escapeKey);
+
+    EXPECT_TRUE(list(ListKind::Old).at(0).vfx());
+}
+
+TEST_F(MainGuiTest, ShowsSettingsThatChangeElsewhere)
+{
+    activate();
+    click("Settings Button");
+    auto& renaming = find<juce::ToggleButton>(settingsDialog(), "B Roll Renaming");
+    const bool before = renaming.getToggleState();
+    m_model.settings().setBRollRenaming(!before);
+
+    EXPECT_EQ(renaming.getToggleState(), !before);
+}
+
+TEST_F(MainGuiTest, ClosesTheSettingsWhenAnotherProjectComes)
+{
+    activate();
+    click("Settings Button");
+    DataModel other;
+    notify(core::DataModelChangeContext(&other));
+    EXPECT_FALSE(settingsDialog().isVisible());
+    EXPECT_TRUE(settingsDialog().isEnabled());
+    deactivate();
+
+    EXPECT_FALSE(settingsDialog().isEnabled());
+}
+
 // ---- The run -------------------------------------------------------------------------------------------------------
 
 TEST_F(MainGuiTest, StartsARunAndIsDisabledUntilItsEnd)

@@ -127,21 +127,17 @@ protected:
             .toStdString();
     }
     gui::FileDialog& fileDialog() const { return find<gui::FileDialog>(*m_gui, "m_fileDialog"); }
-    gui::TcEditDialog& editDialog() const
+    gui::TcEditDialog& editDialog() const { return sheet<gui::TcEditDialog>(); }
+    gui::NewVideosDialog& videosDialog() const { return sheet<gui::NewVideosDialog>(); }
+    gui::SettingsDialog& settingsDialog() const { return sheet<gui::SettingsDialog>(); }
+    template <class Dialog>
+    Dialog& sheet() const
     {
         for (juce::Component* const child : m_gui->getChildren()) {
-            if (auto* const dialog = dynamic_cast<gui::TcEditDialog*>(child))
+            if (auto* const dialog = dynamic_cast<Dialog*>(child))
                 return *dialog;
         }
-        throw std::runtime_error("there is no edit dialog");
-    }
-    gui::NewVideosDialog& videosDialog() const
-    {
-        for (juce::Component* const child : m_gui->getChildren()) {
-            if (auto* const dialog = dynamic_cast<gui::NewVideosDialog*>(child))
-                return *dialog;
-        }
-        throw std::runtime_error("there is no dialog of the videos");
+        throw std::runtime_error("there is no such sheet");
     }
     gui::VideoDisplay& video() const { return find<gui::VideoDisplay>(controls(), "videodisplay"); }
     /// What the video preview says: "old time - new time".

@@ -2,7 +2,9 @@
 
 #include "host/project/PreviewRecord.h"
 
+#include "host/border/HostFailure.h"
 #include "host/border/NumberList.h"
+#include "host/project/EventPrint.h"
 #include "standin/project/ClipEvent.h"
 #include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
@@ -10,7 +12,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstddef>
 #include <functional>
+#include <limits>
 #include <string>
 #include <vector>
 
@@ -47,7 +51,9 @@ protected:
         host.edit(u"Keep", [&] { kept.keepOn(host.context(), track); });
     }
     std::optional<PreviewRecord> kept() const { return PreviewRecord::keptBy(track); }
-    void store(const Numbers& numbers) { writeNumbers(host.context(), *node, AttributeKey::Preview, numbers); }
+    void store(const Numbers& numbers) { store(AttributeKey::Preview, numbers); }
+    void store(const char* key, const Numbers& numbers) { writeNumbers(host.context(), *node, key, numbers); }
+    Numbers stored(const char* key) { return readNumbers(*node, key).value_or(Numbers()); }
 
     TrackHost::Node child(std::size_t index) { return standin::tests::childrenOf(*node)[index]; }
     Names othersOf(const PreviewRecord& written)
@@ -139,6 +145,47 @@ TEST_F(PreviewRecordTest, TellsWhatWasMovedTrimmedRenamedOrSlippedFromWhatWasWri
     EXPECT_EQ(othersOf(*kept()), (Names{"late", "twO"}));
 }
 
+TEST_F(PreviewRecordTest, TellsAClipThatWasGivenAnotherFile)
+{
+    addCopies();
+    auto& first = host.addMedia(u"/sound/first take.wav", 60.0);
+    auto& second = host.addMedia(u"/sound/second take.wav", 60.0);
+    auto& copy = dynamic_cast<standin::ClipEvent&>(*child(3));
+    copy.setClip(Counted<standin::MediaClip>::share(&first));
+    keep(record());
+    EXPECT_EQ(othersOf(*kept()), Names{"late"});
+
+    copy.setClip(Counted<standin::MediaClip>::share(&second));
+    EXPECT_EQ(othersOf(*kept()), (Names{"late", "two"}));
+    copy.setClip(nullptr);
+    EXPECT_EQ(othersOf(*kept()), (Names{"late", "two"}));
+}
+
+TEST_F(PreviewRecordTest, TellsAPartInWhichSomethingWasEdited)
+{
+    const TrackHost::Node part = host.addPart(node, u"reel", 100.0, 130.0);
+    const TrackHost::Node inner = host.addPart(part, u"scene", 100.0, 120.0);
+    const TrackHost::Node deep = host.addClip(inner, u"take", 105.0, 110.0);
+    host.addClip(part, u"atmo", 120.0, 130.0);
+    keep(record());
+    EXPECT_EQ(othersOf(*kept()), Names{"late"});
+
+    const std::vector<std::function<void()>> edits{
+        [&] { deep->setStart(nullptr, 0, 106.0); },
+        [&] { deep->setEnd(nullptr, 0, 111.0); },
+        [&] { deep->setName(nullptr, standin::tests::text(u"better take").get(), 0); },
+        [&] { dynamic_cast<standin::ClipEvent&>(*deep).setSourceOffset(0.5); },
+        [&] { requireOk(host.transaction()->remove(host.root(), deep.get())); },
+        [&] { host.addClip(inner, u"take", 112.0, 114.0); },
+        [&] { host.addClip(part, u"take", 112.0, 114.0); }};
+    for (const auto& change : edits) {
+        host.edit(u"Edit", change);
+        EXPECT_EQ(othersOf(*kept()), (Names{"late", "reel"}));
+        ASSERT_TRUE(host.undo());
+        EXPECT_EQ(othersOf(*kept()), Names{"late"});
+    }
+}
+
 TEST_F(PreviewRecordTest, TellsACopyOfACopyThatTheUserHasLaidOverIt)
 {
     addCopies();
@@ -168,6 +215,110 @@ TEST_F(PreviewRecordTest, ReadsThoseOfEarlierProjectsWhichKnowPlacesAlone)
     EXPECT_EQ(othersOf(*kept()), (Names{"late", "one", "three"}));
 }
 
+TEST_F(PreviewRecordTest, ReadsThoseOfEarlierProjectsWhichKnowNamesButNoContent)
+{
+    addCopies();
+    auto& copy = dynamic_cast<standin::ClipEvent&>(*child(3));
+    store({100.0, 1.0, 25.0, 0.0, 130.0, 100.0, 110.0, 0.0, namePrintOf(*child(2)) * 1.0, 110.0, 130.0, 0.0,
+           namePrintOf(copy) * 1.0});
+    copy.setClip(Counted<standin::MediaClip>::share(&host.addMedia(u"/sound/take.wav", 60.0)));
+
+    ASSERT_TRUE(kept());
+    EXPECT_EQ(kept()->end(), 130.0);
+    ASSERT_TRUE(kept()->framerate());
+    EXPECT_EQ(othersOf(*kept()), Names{"late"}) << "That it has another clip can't be told.";
+    copy.setName(nullptr, standin::tests::text(u"three").get(), 0);
+    EXPECT_EQ(othersOf(*kept()), (Names{"late", "three"}));
+}
+
+TEST_F(PreviewRecordTest, ItsHeadIsReadWithoutItsEvents)
+{
+    addCopies();
+    keep(record());
+    for (const bool isDamaged : {false, true}) {
+        SCOPED_TRACE(isDamaged);
+        if (isDamaged)
+            store(AttributeKey::PreviewEvents, {100.0, 110.0});
+
+        const auto head = PreviewRecord::headKeptBy(track);
+
+        ASSERT_TRUE(head);
+        EXPECT_EQ(head->start, 100.0);
+        EXPECT_EQ(head->end, 130.0);
+        EXPECT_EQ(head->framerate->framesPerSecond, 25);
+        EXPECT_EQ(kept().has_value(), !isDamaged);
+    }
+    store({100.0, 135.0, 100.0, 110.0});
+    EXPECT_EQ(PreviewRecord::headKeptBy(track)->end, 135.0);
+    store({100.0, 99.0});
+    EXPECT_FALSE(PreviewRecord::headKeptBy(track));
+    PreviewRecord::dropFrom(track);
+    EXPECT_FALSE(PreviewRecord::headKeptBy(track));
+    EXPECT_EQ(node->hasAttribute(AttributeKey::PreviewEvents), ResultFalse);
+}
+
+TEST_F(PreviewRecordTest, IsNoneOnceAnyNumberIsDamaged)
+{
+    addCopies();
+    keep(record());
+    for (const char* const key : {AttributeKey::Preview, AttributeKey::PreviewEvents}) {
+        SCOPED_TRACE(key);
+        const Numbers numbers = stored(key);
+        ASSERT_EQ(numbers.size(), key == AttributeKey::Preview ? 7U : 8U);
+        const auto expectNone = [&](const Numbers& damaged) {
+            SCOPED_TRACE(testing::PrintToString(damaged));
+            store(key, damaged);
+            EXPECT_FALSE(kept());
+            EXPECT_EQ(PreviewRecord::headKeptBy(track).has_value(), key != AttributeKey::Preview);
+        };
+        for (std::size_t index = 0; index < numbers.size(); ++index) {
+            for (const double wrong : {numbers[index] + 1.0, 1e9, -1.0, std::numeric_limits<double>::quiet_NaN()}) {
+                Numbers damaged = numbers;
+                damaged[index] = wrong;
+                expectNone(damaged);
+            }
+        }
+        Numbers shorter = numbers;
+        shorter.pop_back();
+        expectNone(shorter);
+        expectNone({});
+        store(key, numbers);
+        EXPECT_TRUE(kept());
+    }
+    node->removeAttribute(AttributeKey::PreviewEvents);
+    EXPECT_FALSE(kept());
+}
+
+TEST_F(PreviewRecordTest, AnEndBeforeThatOfItsEventsIsTheirs)
+{
+    store({100.0, 105.0, 100.0, 110.0});
+    EXPECT_EQ(kept()->end(), 110.0);
+    store({100.0, 1.0, 25.0, 0.0, 105.0, 100.0, 110.0, 0.0, 7.0});
+    EXPECT_EQ(kept()->end(), 110.0);
+}
+
+TEST_F(PreviewRecordTest, IsNoneWhereItCannotHaveBeenWritten)
+{
+    // All that was there stands before the start, which is after the begin of the timeline, and a day is added at most.
+    const double furthest = 2.0 * (100.0 + 86400.0);
+    for (const Numbers& numbers :
+         {Numbers{0.0}, Numbers{-1.0}, Numbers{0.0, 10.0, 0.0, 10.0}, Numbers{100.0, furthest + 1.0},
+          Numbers{100.0, 1.0, 25.0, 0.0, 1e9}, Numbers{100.0, 110.0, 0.0, 10.0}, Numbers{100.0, 110.0, 99.99, 110.0},
+          Numbers{100.0, 1.0, 25.0, 0.0, 110.0, 0.0, 10.0, 0.0, 7.0}}) {
+        SCOPED_TRACE(testing::PrintToString(numbers));
+        store(numbers);
+
+        EXPECT_FALSE(kept());
+        EXPECT_FALSE(PreviewRecord::headKeptBy(track));
+    }
+    for (const Numbers& numbers : {Numbers{0.001}, Numbers{100.0, furthest}, Numbers{100.0, 110.0, 100.0, 110.0}}) {
+        SCOPED_TRACE(testing::PrintToString(numbers));
+        store(numbers);
+
+        EXPECT_TRUE(kept());
+    }
+}
+
 TEST_F(PreviewRecordTest, IsNoneWhereTheNumbersMakeNoSense)
 {
     EXPECT_FALSE(kept());
@@ -182,8 +333,8 @@ TEST_F(PreviewRecordTest, IsNoneWhereTheNumbersMakeNoSense)
         EXPECT_TRUE(PreviewRecord::isKeptBy(track));
         EXPECT_FALSE(kept());
     }
-    for (const Numbers& numbers : {Numbers{1e9}, Numbers{-1e9}, Numbers{100.0, 100.0},
-                                   Numbers{100.0, 1.0, 25.0, 0.0, 99.0}, Numbers{100.0, 1.0, 25.0, 0.0, 100.0}}) {
+    for (const Numbers& numbers : {Numbers{1e9}, Numbers{100.0, 100.0}, Numbers{100.0, 1.0, 25.0, 0.0, 99.0},
+                                   Numbers{100.0, 1.0, 25.0, 0.0, 100.0}}) {
         SCOPED_TRACE(testing::PrintToString(numbers));
         store(numbers);
 

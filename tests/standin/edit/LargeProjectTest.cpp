@@ -5,6 +5,7 @@
 #include "tests/support/standin/TestHost.h"
 
 #include "standin/project/Track.h"
+#include "tests/support/NotQuadratic.h"
 #include "tests/support/SecondsOf.h"
 #include "velmark/Events.h"
 #include "velmark/Media.h"
@@ -16,6 +17,7 @@
 #include <functional>
 
 using namespace Velmark;
+using cadrel::tests::expectNotQuadratic;
 using cadrel::tests::secondsOf;
 
 namespace standin::tests {
@@ -162,12 +164,7 @@ double secondsToEdit(int clips)
 
 TEST(LargeProject, NoEditIsQuadraticInClips)
 {
-    secondsToEdit(1000); // so that the memory is there
-
-    const double few = std::max(secondsToEdit(2500), secondsToEdit(2500));
-    const double many = std::min(secondsToEdit(10000), secondsToEdit(10000));
-
-    EXPECT_LT(many, 8.0 * few);
+    expectNotQuadratic(2500, secondsToEdit);
 }
 
 TEST(LargeProject, AWalkOverTheMediaPoolByIndexIsNotQuadratic)
@@ -182,13 +179,9 @@ TEST(LargeProject, AWalkOverTheMediaPoolByIndexIsNotQuadratic)
                 pool->itemAt(index, TypeWord::Audio)->getName();
         });
     };
-    secondsToWalk(1000);
 
-    // So many, because a clip takes longer once all of them no longer fit into the processor's cache.
-    const double few = std::max(secondsToWalk(10000), secondsToWalk(10000));
-    const double many = std::min(secondsToWalk(200000), secondsToWalk(200000));
-
-    EXPECT_LT(many, 100.0 * few);
+    // So many, because a clip takes longer once not all of them fit into the processor's cache.
+    expectNotQuadratic(50000, secondsToWalk);
 }
 
 TEST(LargeProject, WhatLiesOutsideOfARangeDoesNotCount)
@@ -251,34 +244,24 @@ TEST(LargeProject, NoEditIsQuadraticInWhatIsStackedOnOneTrack)
     };
 
     for (const Stack stack : {Stack::Clips, Stack::Ranges, Stack::Points}) {
-        secondsToConform(stack, 500);
-        const double few = std::max(secondsToConform(stack, 2000), secondsToConform(stack, 2000));
-        const double many = std::min(secondsToConform(stack, 8000), secondsToConform(stack, 8000));
-        EXPECT_LT(many, 8.0 * few) << static_cast<int>(stack);
+        SCOPED_TRACE(static_cast<int>(stack));
+        expectNotQuadratic(2000, [&](int count) { return secondsToConform(stack, count); });
     }
 }
 
 TEST(LargeProject, NoJoinIsQuadraticInCopiesOfOneClip)
 {
-    StackedCopies(512, false).secondsToJoin(1.0);
-
     for (const bool areInAPart : {false, true}) {
-        const auto seconds = [&](int count) { return StackedCopies(count, areInAPart).secondsToJoin(1.0); };
-        const double few = std::max(seconds(4096), seconds(4096));
-        const double many = std::min(seconds(16384), seconds(16384));
-        EXPECT_LT(many, 8.0 * few) << areInAPart;
+        SCOPED_TRACE(areInAPart);
+        expectNotQuadratic(4096, [&](int count) { return StackedCopies(count, areInAPart).secondsToJoin(1.0); });
     }
 }
 
 TEST(LargeProject, NoSearchForWhatToJoinIsQuadraticInCopiesOfOneClip)
 {
     const auto seconds = [](int count) { return StackedCopies(count, false).secondsToJoin(0.0); };
-    seconds(512);
 
-    const double few = std::max(seconds(4096), seconds(4096));
-    const double many = std::min(seconds(16384), seconds(16384));
-
-    EXPECT_LT(many, 8.0 * few);
+    expectNotQuadratic(4096, seconds);
 }
 
 } // namespace standin::tests

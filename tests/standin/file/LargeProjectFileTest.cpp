@@ -4,11 +4,12 @@
 // as many.
 
 #include "tests/standin/file/ProjectText.h"
+#include "tests/support/NotQuadratic.h"
+#include "tests/support/SecondsOf.h"
 
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <ctime>
 #include <string>
 
 namespace standin::tests {
@@ -39,21 +40,14 @@ std::string largeText(int clips)
 double secondsToReadAndWrite(int clips)
 {
     const std::string text = largeText(clips);
-    const std::clock_t begun = std::clock();
-    ProjectTexts().textAgain(text);
-    return static_cast<double>(std::clock() - begun) / CLOCKS_PER_SEC;
+    return cadrel::tests::secondsOf([&] { ProjectTexts().textAgain(text); });
 }
 
 } // namespace
 
 TEST(LargeProjectFile, IsReadAndWrittenWithoutAStepThatIsQuadraticInClips)
 {
-    secondsToReadAndWrite(1000); // so that the memory is there
-
-    const double few = std::max(secondsToReadAndWrite(2500), secondsToReadAndWrite(2500));
-    const double many = std::min(secondsToReadAndWrite(10000), secondsToReadAndWrite(10000));
-
-    EXPECT_LT(many, 8.0 * few);
+    cadrel::tests::expectNotQuadratic(2500, secondsToReadAndWrite);
 }
 
 } // namespace standin::tests
