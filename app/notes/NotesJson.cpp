@@ -180,6 +180,7 @@ private:
                 {"events", events.size()},
                 {"invalid", events.countInvalid()},
                 {"unread", toJson(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread)},
+                {"overlappingFiles", isNew ? m_document.cuts.newOverlapping : m_document.cuts.oldOverlapping},
                 {"doubts", std::move(doubts)}};
     }
 
