@@ -9,6 +9,7 @@
 #include "app/console/Wording.h"
 #include "app/edl/ProjectFramerate.h"
 #include "app/settings/SettingsTable.h"
+#include "core/settings/FrameBounds.h"
 #include "core/settings/Settings.h"
 
 #include <CLI/CLI.hpp>
@@ -245,7 +246,7 @@ public:
                     add([kind, frames](Settings& settings) { settings.set(kind.option, frames); });
                 },
                 m_entry.help)
-            ->check(CLI::Range(0, MostFrames))
+            ->check(CLI::Range(core::FrameBounds::Fewest, core::FrameBounds::Most))
             ->type_name("FRAMES");
     }
 
@@ -262,7 +263,7 @@ public:
                                                });
                                            },
                                            m_entry.help)
-                                       ->check(CLI::Range(Number(0), kind.greatest))
+                                       ->check(CLI::Range(kind.least, kind.greatest))
                                        ->type_name(kind.numberName);
         addOff(kind.isOn, kind.offHelp)->excludes(bound);
         return bound;

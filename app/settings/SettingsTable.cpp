@@ -2,11 +2,14 @@
 
 #include "app/settings/SettingsTable.h"
 
+#include "core/settings/FrameBounds.h"
+
 #include <algorithm>
 #include <array>
 
 namespace cadrel::app {
 
+using core::FrameBounds;
 using core::Settings;
 using Use = SettingEntry::Use;
 
@@ -31,12 +34,12 @@ const std::array Table{
         "them"},
     SettingEntry{"overhang", Use::Run,
                  BoundSetting<std::int32_t>{&Settings::includeOverhangingAudioEvents, &Settings::snippetThreshold,
-                                            MostFrames, "FRAMES",
+                                            FrameBounds::Fewest, FrameBounds::Most, "FRAMES",
                                             "Cut clips exactly where their stretch ends (default)"},
                  "Let clips that hang over the end of a stretch by up to so many frames go along with it whole or not "
                  "at all"},
     SettingEntry{"overhang-percent", Use::Run,
-                 BoundSetting<double>{&Settings::snippetUsesPercentage, &Settings::snippetMaxPercentage, 100.0,
+                 BoundSetting<double>{&Settings::snippetUsesPercentage, &Settings::snippetMaxPercentage, 0.0, 100.0,
                                       "PERCENT", "However much of the clip it is"},
                  "The largest part of a clip that counts as hanging over (default 50)"},
     SettingEntry{"remains", Use::Run, FramesSetting{&Settings::remainsThreshold},

@@ -25,9 +25,6 @@ struct ChoiceSetting {
     const char* wordName; ///< in the help
 };
 
-/// The most that an option takes.
-constexpr std::int32_t MostFrames = 10000;
-
 /// A number of frames: `--name FRAMES`.
 struct FramesSetting {
     core::Option<std::int32_t> core::Settings::*option;
@@ -38,6 +35,7 @@ template <typename Number>
 struct BoundSetting {
     core::Option<bool> core::Settings::*isOn;
     core::Option<Number> core::Settings::*bound;
+    Number least;
     Number greatest;
     const char* numberName; ///< in the help
     const char* offHelp;    ///< for `--no-name`

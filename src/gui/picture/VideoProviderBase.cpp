@@ -58,6 +58,13 @@ void VideoProviderBase::notifyImageChanged(std::size_t side)
     m_listeners.forEach([&](Listener& listener) { listener.imageChanged(side); });
 }
 
+bool VideoProviderBase::hasListeners() const
+{
+    bool hasAny = false;
+    m_listeners.forEach([&](Listener&) { hasAny = true; });
+    return hasAny;
+}
+
 void VideoProviderBase::request(std::size_t side)
 {
     if (m_size.isOrigin())

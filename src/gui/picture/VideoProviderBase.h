@@ -57,6 +57,8 @@ public:
     void removeListener(Listener* listener) { m_listeners.remove(listener); }
 
 protected:
+    /// Whether anybody looks at the pictures.
+    bool hasListeners() const;
     /// The picture is delivered some time later. `time` in seconds of the project's clock; `lastFrame` as setLastFrame.
     virtual void requestImage(std::size_t side, int width, int height, bool lastFrame, double time) = 0;
 

@@ -76,11 +76,12 @@ public:
     }
     void focusOfChildComponentChanged(FocusChangeType cause) override
     {
+        // A listener may delete the input.
+        const SafePointer<StartInput> self(this);
+        TcInput::focusOfChildComponentChanged(cause);
         guardSystem([&] {
-            const SafePointer<StartInput> self(this);
-            TcInput::focusOfChildComponentChanged(cause);
-            if (self && hasKeyboardFocus(true))
-                bringIntoView(*this);
+            if (self && self->hasKeyboardFocus(true))
+                bringIntoView(*self);
         });
     }
 
@@ -225,25 +226,27 @@ void VideoListTableModel::toggleSelected()
 template <class Edit>
 void VideoListTableModel::edit(const Edit& change)
 {
-    guardUser([&] {
-        // Whoever is told of the change may end the model.
-        const std::weak_ptr<const char> life = m_life;
-        guardUser(change);
-        if (!life.expired())
-            reload();
-    });
+    // Whoever is told of the change may end the model.
+    const std::weak_ptr<const char> life = m_life;
+    guardUser(change);
+    if (!life.expired())
+        reload();
 }
 
 void VideoListTableModel::timecodeChanged(TcInput& input)
 {
-    if (const auto* const start = dynamic_cast<const StartInput*>(&input))
-        edit([this, path = start->path, value = start->getValue()] { m_rows.setStart(path, value); });
+    guardUser([&] {
+        const auto& start = dynamic_cast<const StartInput&>(input);
+        edit([this, path = start.path, value = start.getValue()] { m_rows.setStart(path, value); });
+    });
 }
 
 void VideoListTableModel::buttonClicked(juce::Button* button)
 {
-    if (const auto* const box = dynamic_cast<const UseBox*>(button))
-        edit([this, path = box->path, isUsed = box->getToggleState()] { m_rows.setUsed(path, isUsed); });
+    guardUser([&] {
+        const auto& box = dynamic_cast<const UseBox&>(*button);
+        edit([this, path = box.path, isUsed = box.getToggleState()] { m_rows.setUsed(path, isUsed); });
+    });
 }
 
 // ---- Cells ---------------------------------------------------------------------------------------------------------

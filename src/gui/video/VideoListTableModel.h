@@ -61,7 +61,7 @@ private:
         int column = 0; ///< 0 where there is none
     };
 
-    /// Carries out what the user has done, and shows what has become of it.
+    /// Carries out what the user has done, and shows what has become of it. Call it in a guard, which tells of a failure.
     template <class Edit>
     void edit(const Edit& change);
     void reload();

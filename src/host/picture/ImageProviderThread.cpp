@@ -70,6 +70,13 @@ bool ImageProviderThread::fetch(juce::Image& image, bool& success)
             }
         }
     }
+    return discard();
+}
+
+bool ImageProviderThread::discard()
+{
+    if (m_state != State::Finished)
+        return false;
     m_requestFrame = {};
     m_state = State::Free;
     return true;

@@ -45,6 +45,8 @@ public:
     bool request(juce::Point<int> size, VideoFrame frame);
     /// Whether a picture has come that was asked for. Without `success` there is none of that frame, and `image` stays.
     bool fetch(juce::Image& image, bool& success);
+    /// Lets go of a picture that has come. False when there is none.
+    bool discard();
 
 private:
     enum class State { Free, Requested, Finished };

@@ -51,6 +51,12 @@ void SingleImageProvider::poll()
         m_dirty = !startRequest();
 }
 
+void SingleImageProvider::discard()
+{
+    if (m_thread->discard() && m_isAwaited)
+        m_dirty = true;
+}
+
 void SingleImageProvider::sourceChanged()
 {
     m_dirty = !m_size.isOrigin();

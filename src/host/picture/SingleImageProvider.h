@@ -32,6 +32,10 @@ public:
     /// To be called over and over, from the main thread.
     void poll();
 
+    /// To be called in the place of `poll` while nobody looks at the pictures. Delivers nothing and lets go of what has come;
+    /// a later `poll` asks for it again.
+    void discard();
+
     /// Asks again for what was asked last.
     void sourceChanged() override;
 

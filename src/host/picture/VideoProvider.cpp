@@ -11,8 +11,9 @@ VideoProvider::VideoProvider(Velmark::IHostContext* context)
 
 void VideoProvider::poll()
 {
+    // Without a window there may be no JUCE to draw with.
     for (SingleImageProvider& image : m_images)
-        image.poll();
+        hasListeners() ? image.poll() : image.discard();
 }
 
 void VideoProvider::requestImage(std::size_t side, int width, int height, bool lastFrame, double time)

@@ -18,7 +18,8 @@ public:
     /// The context outlives the provider.
     explicit VideoProvider(Velmark::IHostContext* context);
 
-    /// Delivers what has come and asks for what is wanted.
+    /// Delivers what has come and asks for what is wanted. While it has no listeners, nothing is drawn; what was wanted
+    /// meanwhile comes when it has one again.
     void poll() override;
 
     VideoTrackHandler& getTrackHandler() override { return tracks(); }

@@ -4,7 +4,6 @@
 
 #include "core/serialize/ByteArchive.h"
 #include "core/time/SecondsRange.h"
-#include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
 #include "velmark/Events.h"
 #include "velmark/Media.h"
@@ -37,8 +36,10 @@ void addFile(ByteArchive& bytes, IProjectNode& event)
     if (!file)
         return;
     std::array<char16_t, IFilePath::Capacity> path{};
-    requireOk(file->getPath(path.data()));
     bytes << std::uint8_t{1};
+    // One may be longer than can be given.
+    if (file->getPath(path.data()) != ResultOk)
+        return;
     for (const char16_t unit : std::u16string_view(path.data()))
         bytes << static_cast<std::uint32_t>(unit);
 }

@@ -115,7 +115,7 @@ std::vector<MemoSync::Shown> MemoSync::stretchesOf(const Previewed& previewed)
             const SecondsRange source{srcIn + (piece->start - whole.start),
                                       std::min(srcIn + (piece->end - whole.start), srcOut)};
             if (!isEmpty(source))
-                shown.push_back({*next, {source, *piece}, {}});
+                shown.push_back({*next, static_cast<std::size_t>(piece - pieces.rbegin()), {source, *piece}, {}});
         }
     }
     std::ranges::reverse(shown);
@@ -140,7 +140,7 @@ MemoSync::Memo MemoSync::firstOf(std::int64_t id, std::wstring name)
     return {id, std::move(name), First, First};
 }
 
-/// The copies of a previewed event as they were, of which those are found that aren't there any more.
+/// The copies in a stretch as they were, of which those are found that aren't there any more.
 class MemoSync::CopiesThatWere {
 public:
     explicit CopiesThatWere(const Remembered& remembered) : m_copies(remembered.copies) {}
@@ -416,7 +416,7 @@ void MemoSync::remember(const Track& memos, const Previewed& previewed)
     for (const Shown& shown : preview.shown) {
         for (const PlacedMemo& copy : shown.copies) {
             if (!edited.contains(copy.event.node()))
-                found[shown.event].copies.insert(memoOf(copy.event));
+                found[shown.event][shown.piece].copies.insert(memoOf(copy.event));
         }
     }
     m_remembered = std::move(found);
@@ -455,9 +455,18 @@ void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTrans
         return;
     const Preview preview = previewOf(placed, previewed);
     Following(m_hostContext, memos, preview, transaction).follow(std::move(placed), [this](const Shown& shown) {
-        const auto remembered = m_remembered.find(shown.event);
-        return remembered != m_remembered.end() ? &remembered->second : nullptr;
+        return rememberedOf(shown);
     });
+}
+
+const MemoSync::Remembered* MemoSync::rememberedOf(const Shown& shown) const
+{
+    static const Remembered NoCopies;
+    const auto ofEvent = m_remembered.find(shown.event);
+    if (ofEvent == m_remembered.end())
+        return nullptr;
+    const auto ofPiece = ofEvent->second.find(shown.piece);
+    return ofPiece != ofEvent->second.end() ? &ofPiece->second : &NoCopies;
 }
 
 } // namespace cadrel::host

@@ -6,6 +6,7 @@
 #include "core/time/SecondsRange.h"
 #include "host/track/HostEvent.h"
 
+#include <cstddef>
 #include <cstdint>
 #include <map>
 #include <memory>
@@ -80,7 +81,7 @@ private:
 
         auto operator<=>(const Memo&) const = default;
     };
-    /// The copies of a previewed event as they were.
+    /// The copies in a stretch as they were.
     struct Remembered {
         std::set<Memo> copies;
 
@@ -90,6 +91,7 @@ private:
     /// A stretch with the copies that belong to it.
     struct Shown {
         std::shared_ptr<core::EventBase> event;
+        std::size_t piece; ///< of what is left of the event
         Stretch stretch;
         std::vector<PlacedMemo> copies;
     };
@@ -101,6 +103,8 @@ private:
     };
     class Following;
 
+    /// Null where nothing is known of the event.
+    const Remembered* rememberedOf(const Shown& shown) const;
     static std::vector<Shown> stretchesOf(const Previewed& previewed);
     static Preview previewOf(const PlacedMemos& memos, const Previewed& previewed);
     static Memo memoOf(const HostEvent& event);
@@ -109,7 +113,8 @@ private:
     static std::set<const Velmark::IProjectNode*> editedSince(const Track& memos, const std::vector<Shown>& shown);
 
     Velmark::IHostContext* m_hostContext;
-    std::map<std::shared_ptr<core::EventBase>, Remembered> m_remembered;
+    /// By event and piece.
+    std::map<std::shared_ptr<core::EventBase>, std::map<std::size_t, Remembered>> m_remembered;
 };
 
 } // namespace cadrel::host

@@ -163,10 +163,7 @@ void Project::readModel()
     if (resultOf([&] { readPreviewEvents(*list); }) != Result::Ok)
         m_previewEvents->clear();
     // Where nothing is known of the copies, they are compared with their memos.
-    resultOf([this] {
-        findMarkerTracks();
-        rememberMemos();
-    });
+    resultOf([this] { rememberMemos(); });
 }
 
 void Project::readPreviewEvents(IAttributeData& list)

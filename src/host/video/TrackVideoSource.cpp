@@ -3,7 +3,7 @@
 #include "host/video/TrackVideoSource.h"
 
 #include "core/time/Timecode.h"
-#include "host/track/HostEvent.h"
+#include "host/track/Instant.h"
 #include "host/video/VideoTrackHandler.h"
 
 namespace cadrel::host {
@@ -21,11 +21,23 @@ TrackVideoSource::~TrackVideoSource()
     m_handler.removeListener(this);
 }
 
-VideoFrame TrackVideoSource::getFrame(bool lastFrame, double time)
+HostEvent TrackVideoSource::eventPlayedAt(double time) const
+{
+    HostEvent played;
+    const double middle = time + 0.5 / Timecode::framerate().rate;
+    for (const HostEvent& event : m_track.clipEvents()) {
+        const bool isPlayed = !isBefore(middle, event.getStart()) && isBefore(middle, event.getEnd());
+        if (isPlayed && (!played || isBefore(played.getStart(), event.getStart())))
+            played = event;
+    }
+    return played;
+}
+
+VideoFrame TrackVideoSource::getFrame(bool /*lastFrame*/, double time)
 {
     if (VideoTrackHandler::isTurnedOff(m_track))
         return {};
-    const HostEvent event = m_track.eventAt(time, lastFrame ? Track::Direction::Backward : Track::Direction::Forward);
+    const HostEvent event = eventPlayedAt(time);
     if (!event || !event.isClip())
         return {};
     auto clip = event.getClip();

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "gui/services/VideoTrackHandlerBase.h"
+#include "host/track/HostEvent.h"
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
 #include "host/video/VideoSourceBase.h"
@@ -20,7 +21,8 @@ public:
     TrackVideoSource(VideoTrackHandler& handler, std::int32_t mode);
     ~TrackVideoSource() override;
 
-    /// None from a track on which the user has put another video.
+    /// Of the clip that plays in the middle of the frame, the one that began last of several. `lastFrame` is ignored, as the
+    /// time is that of the frame itself. None from a track on which the user has put another video.
     VideoFrame getFrame(bool lastFrame, double time) override;
 
     void tracksChanged() override;
@@ -28,6 +30,9 @@ public:
     void projectChanged(Project& project) override;
 
 private:
+    /// Empty without one.
+    HostEvent eventPlayedAt(double time) const;
+
     VideoTrackHandler& m_handler;
     Track m_track;
     std::int32_t m_mode;

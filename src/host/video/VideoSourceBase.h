@@ -32,8 +32,8 @@ public:
     VideoSourceBase& operator=(const VideoSourceBase&) = delete;
     virtual ~VideoSourceBase() = default;
 
-    /// `time` in seconds of the project's clock. `lastFrame` asks for the picture before an OUT point, which decides for
-    /// one of two clips that meet there.
+    /// The frame that begins at `time`, in seconds of the project's clock. `lastFrame` tells that it is the last one before an
+    /// OUT point.
     virtual VideoFrame getFrame(bool lastFrame, double time) = 0;
 
     /// Listeners are not owned.

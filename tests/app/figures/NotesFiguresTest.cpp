@@ -1,13 +1,16 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/Film.h"
+#include "tests/app/NotesOfCuts.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/figures/EdlFrames.h"
 #include "tests/app/figures/NotesReplay.h"
+#include "tests/app/figures/PrintedNotes.h"
 #include "tests/support/TreePaths.h"
 
 #include <algorithm>
 #include <cstddef>
+#include <functional>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <regex>
@@ -100,11 +103,7 @@ std::string outputOf(const char* command, const Recut& recut, const char* output
     arguments.insert(arguments.end(), {output, folder / file});
     const Outcome outcome = runCadrel(arguments);
     EXPECT_EQ(outcome.status, 0) << outcome.err;
-    if (!file.ends_with(".pdf"))
-        return contentOf(folder / file);
-    const Outcome text = runProgram("pdftotext", {"-layout", folder / file, "-"});
-    EXPECT_EQ(text.status, 0) << text.err;
-    return text.out;
+    return file.ends_with(".pdf") ? textOfPdf(folder / file) : contentOf(folder / file);
 }
 
 json notesOf(const Recut& recut, const std::vector<std::string>& more = {})
@@ -478,6 +477,246 @@ TEST_F(NotesFigures, OfTheCsvAreThoseOfTheSteps)
         ASSERT_EQ(lines.size(), expected.size() + 1);
         for (std::size_t step = 0; step < expected.size(); ++step)
             EXPECT_TRUE(lines[step + 1].starts_with(expected[step])) << lines[step + 1] << "\n" << expected[step];
+    }
+}
+
+/// With one blank for any number of them and of line ends, and none before a colon or a comma.
+std::string joinedWords(const std::string& text)
+{
+    std::istringstream words(text);
+    std::string all;
+    for (std::string word; words >> word;)
+        all.append(all.empty() || word == ":" || word.starts_with(",") ? "" : " ").append(word);
+    return all;
+}
+
+/// Where two texts part, with what stands around there; empty where they are the same.
+std::string partingOf(const std::string& actual, const std::string& expected)
+{
+    if (actual == expected)
+        return {};
+    const auto place =
+        std::mismatch(actual.begin(), actual.end(), expected.begin(), expected.end()).first - actual.begin();
+    const auto from = static_cast<std::size_t>(std::max<std::ptrdiff_t>(0, place - 60));
+    const auto around = [from](const std::string& text) { return text.substr(std::min(from, text.size()), 160); };
+    return "is:     " + around(actual) + "\nbut for: " + around(expected);
+}
+
+std::string from(const std::string& text, const std::string& start)
+{
+    const std::size_t first = text.find(start);
+    return first == std::string::npos ? "" : text.substr(first);
+}
+
+std::string without(const std::string& page, const std::string& start, const std::string& end)
+{
+    std::string rest;
+    std::size_t at = 0;
+    for (std::size_t first = 0; (first = page.find(start, at)) != std::string::npos;) {
+        rest += page.substr(at, first - at);
+        at = page.find(end, first) + end.size();
+    }
+    return rest + page.substr(at);
+}
+
+/// What a person reads on a page, without the picture.
+std::string wordsOfPage(std::string page)
+{
+    for (const auto& [start, end] :
+         {std::pair{"<style>", "</style>"}, {"<script>", "</script>"}, {"<svg", "</svg>"}, {"<title>", "</title>"}})
+        page = without(page, start, end);
+    std::string text = plain(page);
+    for (const auto& [entity, letter] : {std::pair{"&lt;", "<"}, {"&gt;", ">"}, {"&quot;", "\""}, {"&amp;", "&"}}) {
+        for (std::size_t at = 0; (at = text.find(entity, at)) != std::string::npos; ++at)
+            text.replace(at, std::string(entity).size(), letter);
+    }
+    return joinedWords(text);
+}
+
+/// The numbers of the reels of both strips, where there are several.
+std::vector<std::string> reelNumbers(const json& notes, const char* side)
+{
+    std::vector<std::string> numbers;
+    const json& reels = notes.at("reels");
+    for (std::size_t reel = 0; reels.size() > 1 && reel < reels.size(); ++reel) {
+        if (!reels[reel].at(side).is_null())
+            numbers.push_back(std::to_string(reel + 1));
+    }
+    return numbers;
+}
+
+/// What is printed between the head of a page and its list of the largest changes.
+std::string stripsOfPage(const json& notes, const EdlFrames& oldCut, const EdlFrames& newCut)
+{
+    const auto times = [](const EdlFrames& cut) {
+        const FrameReel& last = cut.reels().back();
+        return timecodeOfFrames(cut.reels().front().timecode) + " to " +
+               timecodeOfFrames(last.timecode + static_cast<int>(last.frames.size()));
+    };
+    std::string text = "old cut " + times(oldCut);
+    for (const char* const side : {"old", "new"}) {
+        for (const std::string& number : reelNumbers(notes, side))
+            text += " " + number;
+    }
+    return text + " new cut " + times(newCut);
+}
+
+/// The words of all pages but for their feet and the titles of columns, which are looked at here.
+std::string wordsOfPaper(const std::string& paper, const PrintedNotes& printed)
+{
+    static const std::regex Columns("\\s*step +at +what to do, and what changes +length +offset");
+    static const std::regex Continued("Reel ([0-9]+), continued");
+    static const std::regex Heading("Reel ([0-9]+), [0-9]{2}:.*");
+    std::vector<std::vector<std::string>> pages(1);
+    for (std::string line : linesOf(paper)) {
+        const bool isNext = line.starts_with('\f');
+        if (isNext && line.size() > 1)
+            pages.emplace_back();
+        line.erase(0, isNext ? 1 : 0);
+        if (!joinedWords(line).empty())
+            pages.back().push_back(line);
+    }
+    std::string text;
+    std::string reel;
+    for (std::size_t page = 0; page < pages.size(); ++page) {
+        EXPECT_EQ(joinedWords(pages[page].back()),
+                  printed.cuts() + " page " + std::to_string(page + 1) + " of " + std::to_string(pages.size()));
+        pages[page].pop_back();
+        for (const std::string& line : pages[page]) {
+            std::smatch match;
+            if (std::regex_match(line, match, Continued)) {
+                EXPECT_EQ(match[1], reel);
+                continue;
+            }
+            reel = std::regex_match(line, match, Heading) ? match[1].str() : reel;
+            if (!std::regex_match(line, Columns))
+                text += line + "\n";
+        }
+    }
+    return joinedWords(text);
+}
+
+/// The numbers that stand in a text, in order of their digits.
+std::vector<std::string> sortedNumbers(const std::string& text)
+{
+    std::vector<std::string> numbers = matchesIn(text, std::regex("[0-9]+"));
+    std::sort(numbers.begin(), numbers.end());
+    return numbers;
+}
+
+/// A form of the notes, by the extension of its file; the JSON is that of the same run.
+using FormOf = std::function<std::string(const std::string& extension)>;
+
+/// Looks at all that the notes of two cuts print in each form but the table.
+void expectPrinted(const FormOf& formOf, const EdlFrames& oldCut, const EdlFrames& newCut)
+{
+    using Form = PrintedNotes::Form;
+    const std::string order = "The steps are carried out";
+    const std::string start = "The largest changes";
+    const json notes = json::parse(formOf(".json"));
+    ASSERT_EQ(NotesReplay(notes, oldCut, newCut).faults(), std::vector<std::string>());
+    // What is doubted in broken cuts has tests of its own.
+    for (const char* const side : {"old", "new"})
+        ASSERT_TRUE(notes.at(side).at("doubts").empty() && notes.at(side).at("unread").empty());
+    const PrintedNotes printed(notes);
+    const std::string text = joinedWords(formOf(".txt"));
+    const std::string html = formOf(".html");
+    const std::string page = wordsOfPage(html);
+    const std::string paper = wordsOfPaper(formOf(".pdf"), printed);
+
+    EXPECT_EQ(partingOf(from(text, start), printed.body(Form::Text)), "");
+    EXPECT_EQ(partingOf(from(page, start), printed.body(Form::Page)), "");
+    EXPECT_EQ(partingOf(from(paper, start), printed.body(Form::Paper)), "");
+
+    const std::string simplified = "--simplify " + std::to_string(notes.at("simplifyFrames").get<int>()) + " ";
+    EXPECT_EQ(partingOf(between(text, "Old cut", " Settings "), printed.headBeforeSettings(Form::Text)), "");
+    EXPECT_EQ(partingOf(between(text, "Length ", " " + order), printed.headAfterSettings(Form::Text)), "");
+    EXPECT_EQ(partingOf(between(page, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Page)), "");
+    EXPECT_EQ(partingOf(between(paper, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Paper)), "");
+    EXPECT_NE(between(text, " Settings ", "Length ").find(simplified), std::string::npos);
+    EXPECT_NE(between(page, " Settings:", order).find(simplified), std::string::npos);
+    EXPECT_NE(between(paper, " Settings:", order).find(simplified), std::string::npos);
+
+    const std::string strips = stripsOfPage(notes, oldCut, newCut);
+    EXPECT_NE(between(page, order, start).find(strips), std::string::npos) << between(page, order, start);
+    EXPECT_EQ(sortedNumbers(between(page, order, start)), sortedNumbers(strips));
+    std::vector<std::string> numbers = reelNumbers(notes, "old");
+    const std::vector<std::string> newNumbers = reelNumbers(notes, "new");
+    numbers.insert(numbers.end(), newNumbers.begin(), newNumbers.end());
+    std::sort(numbers.begin(), numbers.end());
+    EXPECT_EQ(sortedNumbers(between(paper, order, start)), numbers);
+
+    const std::regex title("data-rows=\"s([0-9]+)[^>]*><title>([^<]*)</title>");
+    std::size_t titles = 0;
+    for (std::sregex_iterator match(html.begin(), html.end(), title), end; match != end; ++match, ++titles)
+        EXPECT_EQ((*match)[2], printed.action(std::stoi((*match)[1])));
+    EXPECT_EQ(matchesIn(html, std::regex("<title>")).size(), titles + 1);
+    EXPECT_GT(titles, 0U);
+}
+
+TEST_F(NotesFigures, EveryWordAndNumberThatIsPrintedIsThatOfAChange)
+{
+    std::vector<Recut> recuts = all();
+    recuts.push_back(nudged(cuts));
+    recuts.back().options.insert(recuts.back().options.end(), {"--simplify", "100"});
+    for (const Recut& recut : recuts) {
+        const auto formOf = [&recut](const std::string& extension) {
+            return outputOf("notes", recut, "-o", "notes" + extension, {"--feet"});
+        };
+        expectPrinted(formOf, EdlFrames(recut.oldFiles, recut.rules), EdlFrames(recut.newFiles, recut.rules));
+    }
+}
+
+/// The notes of a run that carries the sound of the example over.
+std::string soundNotes(const std::string& extension, const std::vector<std::string>& more)
+{
+    const TempFolder folder;
+    const std::string file = folder / ("notes" + extension);
+    const Recut recut = example();
+    std::vector<std::string> arguments{"apply",    treePath("examples/reel3/reel3.stage"),
+                                       "--old",    recut.oldFiles.front(),
+                                       "--new",    recut.newFiles.front(),
+                                       "--notes",  file,
+                                       "--summary"};
+    arguments.insert(arguments.end(), recut.options.begin(), recut.options.end());
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    const Outcome outcome = runCadrel(arguments);
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    return extension == ".pdf" ? textOfPdf(file) : contentOf(file);
+}
+
+TEST_F(NotesFigures, EveryWordAndNumberOfTheSoundIsThatOfAChange)
+{
+    const Recut recut = example();
+    // With "cut", the leader falls out where no picture changes.
+    for (const std::vector<std::string>& more :
+         std::vector<std::vector<std::string>>{{}, {"--feet"}, {"--keep", "cut"}, {"--heal", "none"}}) {
+        const auto formOf = [&more](const std::string& extension) { return soundNotes(extension, more); };
+        expectPrinted(formOf, EdlFrames(recut.oldFiles, recut.rules), EdlFrames(recut.newFiles, recut.rules));
+    }
+}
+
+TEST_F(NotesFigures, WholeRowsOfTheSoundInTheCsvAreThoseOfTheChanges)
+{
+    const std::vector<std::string> expected = PrintedNotes(json::parse(soundNotes(".json", {}))).table();
+
+    const std::vector<std::string> rows = linesOf(soundNotes(".csv", {}));
+
+    ASSERT_EQ(rows.size(), expected.size() + 1);
+    for (std::size_t row = 0; row < expected.size(); ++row)
+        EXPECT_EQ(rows[row + 1], expected[row] + "\r");
+}
+
+TEST_F(NotesFigures, WholeRowsOfTheCsvAreThoseOfTheChanges)
+{
+    for (const Recut& recut : all()) {
+        const std::vector<std::string> expected = PrintedNotes(notesOf(recut)).table();
+
+        std::vector<std::string> rows = linesOf(outputOf("notes", recut, "-o", "notes.csv"));
+
+        ASSERT_EQ(rows.size(), expected.size() + 1);
+        for (std::size_t row = 0; row < expected.size(); ++row)
+            EXPECT_EQ(rows[row + 1], expected[row] + "\r");
     }
 }
 

@@ -541,7 +541,7 @@ TEST_F(NewVideosDialogTest, TakesTheStartThatIsTyped)
 {
     open();
     m_window.click(use(0));
-    start(0).getChildComponent(0)->getParentComponent()->grabKeyboardFocus();
+    start(0).grabKeyboardFocus();
     ASSERT_TRUE(hasFocus(start(0)));
 
     m_window.type("02000000");
@@ -550,6 +550,19 @@ TEST_F(NewVideosDialogTest, TakesTheStartThatIsTyped)
     EXPECT_TRUE(hasFocus(start(0)));
     m_window.press(juce::KeyPress::returnKey);
     EXPECT_FALSE(isOpen());
+}
+
+TEST_F(NewVideosDialogTest, TakesNoStartThatTheRateDoesNotHave)
+{
+    open();
+    m_window.click(use(0));
+    start(0).grabKeyboardFocus();
+
+    m_window.type("01000025");
+    EXPECT_EQ(m_list.at(0).start, Timecode("01:00:00:00"));
+
+    m_window.type("24");
+    EXPECT_EQ(m_list.at(0).start, Timecode("01:00:00:24"));
 }
 
 TEST_F(NewVideosDialogTest, TakesTheStartThatWasTypedWhenItIsClosedByAClickOutside)
@@ -596,6 +609,21 @@ TEST_F(NewVideosDialogTest, RefusesAStartThatIsTakenWithAWord)
     EXPECT_EQ(m_alerts.messages.size(), 2U);
     EXPECT_EQ(shown()[2], "*reel3_v12.mov 01:01:00:00");
     EXPECT_EQ(m_undo.entries, (Messages{L"Add New Video", L"Add New Video"}));
+}
+
+TEST_F(NewVideosDialogTest, TellsOfAStartThatIsTakenWhenTheKeyboardLeavesIt)
+{
+    open();
+    m_window.click(use(0));
+    m_window.click(use(1));
+    start(1).grabKeyboardFocus();
+    m_window.type("0100");
+
+    m_window.click(use(2));
+
+    EXPECT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(shown()[1], "*reel2_v12.mov 01:01:00:00");
+    EXPECT_EQ(shown()[2], "*reel3_v12.mov 01:04:00:00") << "the click counts";
 }
 
 TEST_F(NewVideosDialogTest, ShowsWhatIsThereWhenTheUndoEntryFails)

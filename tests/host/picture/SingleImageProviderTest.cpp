@@ -94,14 +94,18 @@ struct Side : tests::ThumbnailHost, VideoProviderBase::Listener {
     }
 
     void request(double time = 10.0) { images->requestImage(160, 90, false, time); }
-    void pollUntil(const std::function<bool()>& isReached)
+    static void waitUntil(const std::function<bool()>& isReached, const std::function<void()>& serve)
     {
         const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(60);
         while (!isReached()) {
             ASSERT_LT(std::chrono::steady_clock::now(), deadline);
-            images->poll();
+            serve();
             std::this_thread::yield();
         }
+    }
+    void pollUntil(const std::function<bool()>& isReached)
+    {
+        waitUntil(isReached, [this] { images->poll(); });
     }
     void pollUntilDelivered(int count)
     {
@@ -310,6 +314,38 @@ TEST(SingleImageProvider, APictureThatComesLateForANewerRequestIsNotShown)
 
     EXPECT_EQ(std::count(shown.begin(), shown.end(), 73), 0);
     EXPECT_EQ(side.frameShown(), 74);
+}
+
+TEST(SingleImageProvider, LetsGoOfAPictureThatNobodySeesAndAsksForItAgainLater)
+{
+    Side side;
+    side.request();
+    side.images->poll();
+    side.source.answer = {};
+
+    // Until it has been taken away, the thread holds its clip.
+    side.waitUntil([&] { return side.clip->refCount() == 1; }, [&] { side.images->discard(); });
+    EXPECT_EQ(side.deliveries, 1);
+    EXPECT_EQ(side.thumbnails.calls().size(), 1U);
+
+    side.source.answer = {side.clip, 73};
+    side.pollUntil([&] { return side.frameShown() >= 0; });
+    EXPECT_EQ(side.frameShown(), 73);
+    EXPECT_EQ(side.thumbnails.calls().size(), 2U);
+}
+
+TEST(SingleImageProvider, AsksForNothingAfterwardsWhenItHasLetGoOfNothing)
+{
+    Side side;
+    side.images->discard();
+    side.images->poll();
+    EXPECT_EQ(side.deliveries, 0);
+
+    side.request();
+    side.pollUntilDelivered(2);
+    side.images->discard();
+    side.images->poll();
+    EXPECT_EQ(side.deliveries, 2);
 }
 
 TEST(SingleImageProvider, APictureThatComesLateDoesNotReplaceTheMessageThatThereIsNone)

@@ -148,6 +148,23 @@ TEST_P(VideoProviderTest, DeliversNothingBeforeItIsPolled)
     EXPECT_EQ(deliveries, (std::array{0, 0}));
 }
 
+TEST_P(VideoProviderTest, DrawsNothingWhileNobodyLooksAtIt)
+{
+    provider.setProject(&host.adapter);
+    provider.setImageSize(Width, Height);
+    const juce::Image empty = provider.getImage(VideoProviderBase::OldSide);
+    provider.removeListener(this);
+    provider.setTime(VideoProviderBase::OldSide, at(11.0));
+    provider.poll();
+    provider.setProject(nullptr);
+    provider.setProject(&host.adapter);
+    provider.poll();
+    EXPECT_EQ(provider.getImage(VideoProviderBase::OldSide), empty);
+
+    provider.addListener(this);
+    expectPicture(VideoProviderBase::OldSide, oldReel, 25);
+}
+
 TEST_P(VideoProviderTest, AsksAgainWhenThePictureOfItsProjectChanges)
 {
     provider.setProject(&host.adapter);

@@ -16,6 +16,7 @@
 #include "velmark/ModuleState.h"
 #include "velmark/Project.h"
 
+#include "tests/host/plugin/WatchedPictures.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/ThisProcess.h"
 #include "tests/support/TreePaths.h"
@@ -27,15 +28,18 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <memory>
 #include <stdexcept>
 #include <string>
 #include <utility>
 #include <vector>
 
 using namespace Velmark;
+using cadrel::gui::VideoProviderBase;
 using cadrel::host::Cadrel;
 using cadrel::host::tests::AlteredContext;
 using cadrel::tests::isMapped;
+using cadrel::tests::PictureWatch;
 using cadrel::tests::ProcessResources;
 
 namespace {
@@ -423,6 +427,36 @@ TEST_F(CadrelTest, TakesItsRegistrationsBackOnceTheLastOneFirst)
     EXPECT_EQ(m_cadrel->terminate(), ResultOk);
     m_cadrel.reset();
     EXPECT_EQ(registries->removed.size(), 3U);
+}
+
+TEST_F(CadrelTest, DrawsNoPicturesAfterItsEndWhenProjectsChange)
+{
+    m_cadrel->initialize(m_application.context());
+    const auto pictures = cadrel::tests::picturesOf(m_application);
+    ASSERT_NE(pictures, nullptr);
+    const auto isDrawn = [&](std::size_t side) { return pictures->getImage(side).getPixelAt(0, 0).isOpaque(); };
+    {
+        // A window has it drawn that there is no video.
+        PictureWatch window(*pictures);
+        pictures->setImageSize(16, 9);
+        m_application.idle();
+        EXPECT_TRUE(isDrawn(VideoProviderBase::OldSide));
+        pictures->setImageSize(32, 18);
+    }
+
+    // The Host lives on, and JUCE doesn't.
+    m_cadrel->terminate();
+    m_application.activateProject(&m_application.createProject());
+    m_application.idle();
+    m_application.idle();
+    EXPECT_FALSE(isDrawn(VideoProviderBase::OldSide));
+    EXPECT_FALSE(isDrawn(VideoProviderBase::NewSide));
+
+    m_cadrel->initialize(m_application.context());
+    const PictureWatch window(*pictures);
+    m_application.idle();
+    EXPECT_TRUE(isDrawn(VideoProviderBase::OldSide));
+    EXPECT_TRUE(isDrawn(VideoProviderBase::NewSide));
 }
 
 TEST_F(CadrelTest, MakesNoViewBeforeItIsInitialised)

@@ -749,6 +749,22 @@ TEST_P(MemoSyncTest, AMemoThatIsPastedInTheFilmStaysAndFollowsNothing)
     }
 }
 
+TEST_P(MemoSyncTest, AMemoThatIsPastedInTheFilmStaysWhereItsEventIsShownInPieces)
+{
+    const auto cue = addMemo(u"cue", 18.0);
+    preview({tenSeconds(), event("01:00:50:00", "01:00:52:00", "01:00:34:00", "01:00:36:00")});
+    ASSERT_EQ(copies(), Content{"cue 38"});
+
+    host.edit(u"Paste", [&] {
+        const auto pasted = addMemo(u"pasted", 12.0);
+        HostEvent(host.handle(memos), pasted).setUserId(idOf(cue));
+    });
+    EXPECT_EQ(film(), (Content{"pasted 12", "cue 18"}));
+
+    remove(copyOf(u"cue"));
+    EXPECT_EQ(film(), Content{"pasted 12"});
+}
+
 TEST_P(MemoSyncTest, OfTwoMemosWithTheSameIdTheOneGoesWhoseCopyIsRemoved)
 {
     addMemo(u"one", 12.0);

@@ -82,24 +82,61 @@ TEST_P(TrackVideoSourceTest, TakesTheFrameThatTheClipCountsAndNoneAfterIt)
     expectNone(14.04);
 }
 
-TEST_P(TrackVideoSourceTest, TakesNoFrameBeforeTheFirst)
+TEST_P(TrackVideoSourceTest, TakesAClipHalfAFrameAheadAndNoFurther)
 {
     host.timecodes.framerate = core::Framerate(50, 0);
     host.addVideoEvent(oldTrack, reel, 10.02, 13.0);
 
-    // The event is found up to 0.02 s ahead, which is a whole frame here.
     expectNone(10.0);
+    expectNone(10.009);
+    expectFrame(10.011, 0, reel);
     expectFrame(10.02, 0, reel);
 }
 
-TEST_P(TrackVideoSourceTest, TheLastFrameIsThatOfTheEarlierOfTwoClipsThatMeet)
+TEST_P(TrackVideoSourceTest, LeavesAClipHalfAFrameBeforeItsEnd)
+{
+    host.addVideoEvent(oldTrack, reel, 10.0, 13.0);
+
+    expectFrame(12.979, 74, reel);
+    expectNone(12.981);
+    expectNone(13.0);
+}
+
+TEST_P(TrackVideoSourceTest, ShowsTheLaterOfTwoClipsThatMeetFromItsStartOn)
 {
     standin::MediaClip& next = host.addVideo(u"/picture/reel4_v07.mov", 4.0);
     host.addVideoEvent(oldTrack, reel, 10.0, 12.0);
     host.addVideoEvent(oldTrack, next, 12.0, 14.0);
 
-    expectFrame(12.0, 0, next, false);
-    expectFrame(12.0, 50, reel, true);
+    for (const bool lastFrame : {false, true}) {
+        expectFrame(11.96, 49, reel, lastFrame);
+        expectFrame(12.0, 0, next, lastFrame);
+    }
+}
+
+TEST_P(TrackVideoSourceTest, ShowsAClipOfOneFrame)
+{
+    standin::MediaClip& flash = host.addVideo(u"/picture/flash.mov", 4.0);
+    host.addVideoEvent(oldTrack, reel, 10.0, 12.0);
+    host.addVideoEvent(oldTrack, flash, 12.0, 12.04, 1.0);
+    host.addVideoEvent(oldTrack, reel, 12.04, 14.0);
+
+    for (const bool lastFrame : {false, true}) {
+        expectFrame(11.96, 49, reel, lastFrame);
+        expectFrame(12.0, 25, flash, lastFrame);
+        expectFrame(12.04, 0, reel, lastFrame);
+    }
+}
+
+TEST_P(TrackVideoSourceTest, ShowsTheClipThatBeganLastOfTwoThatOverlap)
+{
+    standin::MediaClip& next = host.addVideo(u"/picture/reel4_v07.mov", 4.0);
+    host.addVideoEvent(oldTrack, next, 12.0, 13.0);
+    host.addVideoEvent(oldTrack, reel, 10.0, 14.0);
+
+    expectFrame(11.96, 49, reel);
+    expectFrame(12.0, 0, next);
+    expectFrame(13.0, 75, reel);
 }
 
 TEST_P(TrackVideoSourceTest, AnEventThatPlaysNoClipShowsNothing)
