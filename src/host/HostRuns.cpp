@@ -289,7 +289,7 @@ void Host::tellOfLeftOut(const Project& project)
     const std::wstring whose =
         events.size() == 1 ? L"event " + first
                            : std::to_wstring(events.size()) + L" events, the first of them event " + first + L",";
-    showAlert(L"Material of " + whose + L" would stand before the project begins. It has been left out.");
+    showAlert(L"Material of " + whose + L" would stand before the project or its day begins. It has been left out.");
 }
 
 Result::Type Host::withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,

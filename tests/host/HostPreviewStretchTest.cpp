@@ -824,6 +824,49 @@ TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheBeginOfTheHostsTim
     EXPECT_EQ(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), 4.0);
 }
 
+// A second of a clip that hangs over would stand before 00:00:00:00. The last seconds of the day before the preview stretch
+// are the user's.
+TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheDayWhereTheProjectBeginsEarlier)
+{
+    constexpr double Origin = -10.0;
+    AdaptedHost host(Origin);
+    const Node track = host.addTrack(TypeWord::Audio, u"DX");
+    const auto addSound = [&](const char16_t* name, double start, double end) {
+        host.addClip(track, name, start - Origin, end - Origin);
+    };
+    const auto content = [&] {
+        std::vector<Span> spans;
+        for (const Node& child : standin::tests::childrenOf(*track))
+            spans.emplace_back(child->getStart(nullptr) + Origin, child->getEnd(nullptr) + Origin);
+        return spans;
+    };
+    using Spans = std::vector<Span>;
+    addSound(u"leader", -8.0, -3.0);
+    addSound(u"one", 90.0, 105.0);
+    addSound(u"late", Day - 4.0, Day - 0.5);
+    const Spans film = content();
+    const bool isRestricted = GetParam() == 0.0;
+    host.switchMarkersOff();
+    host.settings().setIncludeOverhangingAudioEvents(true);
+    host.settings().setRestrictRange(isRestricted);
+    host.settings().setPreserveMaterial(Origin, 300.0);
+    host.carryOver("00:01:31:00", "00:01:45:00", "00:00:00:00", "00:00:14:00");
+
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(content(), (Spans{{-8.0, -3.0}, {90.0, 105.0}, {Day - 4.0, Day - 0.5}, {Day, Day + 14.0}}));
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(content(), film);
+    EXPECT_EQ(host.alerts->messages.size(), 1U) << "The second is left out.";
+
+    host.conform();
+    Spans conformed{{-8.0, -3.0}, {0.0, 14.0}};
+    if (isRestricted)
+        conformed.emplace_back(Day - 4.0, Day - 0.5);
+    EXPECT_EQ(content(), conformed);
+    EXPECT_EQ(host.alerts->messages.size(), 2U);
+}
+
 // Locks.
 
 TEST_P(HostPreviewStretchTest, LocksItsTracksAgainWhenItsEmptyingIsUndone)

@@ -8,6 +8,7 @@
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
+#include "standin/project/Track.h"
 #include "standin/services/IdleManager.h"
 #include "tests/support/core/RecordingListener.h"
 #include "tests/support/host/AdaptedHost.h"
@@ -808,7 +809,8 @@ TEST_P(HostRunTest, TellsWhatWouldStandBeforeTheProjectBegins)
 
         host.conform();
 
-        const Entries told{u"Material of event 2 would stand before the project begins. It has been left out."};
+        const Entries told{
+            u"Material of event 2 would stand before the project or its day begins. It has been left out."};
         EXPECT_EQ(host.alerts->messages, at.isTold ? told : Entries());
         EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
         ASSERT_TRUE(host.undo());
@@ -828,8 +830,8 @@ TEST_P(HostRunTest, TellsOfHowManyEventsSomethingWouldStandBeforeTheProjectBegin
 
     host.conform();
     const Entries told{
-        u"Material of 2 events, the first of them event 2, would stand before the project begins. It has "
-        u"been left out."};
+        u"Material of 2 events, the first of them event 2, would stand before the project or its day begins. "
+        u"It has been left out."};
     EXPECT_EQ(host.alerts->messages, told);
 
     ASSERT_TRUE(host.undo());
@@ -837,6 +839,35 @@ TEST_P(HostRunTest, TellsOfHowManyEventsSomethingWouldStandBeforeTheProjectBegin
     host.idle();
     host.conform();
     EXPECT_EQ(host.alerts->messages, told) << "There is room for all of it, and nothing is told again.";
+}
+
+TEST_P(HostRunTest, EmptiesNoTrackThatTheUserSelectsOrUnlocksMeanwhile)
+{
+    const auto other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"bed", 0.0, 20.0);
+    auto& chosen = dynamic_cast<standin::Track&>(*track);
+    auto& left = dynamic_cast<standin::Track&>(*other);
+    chosen.setSelected(true);
+    for (const bool isLocked : {false, true}) {
+        SCOPED_TRACE(isLocked);
+        host.settings().setApplyTo(isLocked ? core::ApplyTo::AllTracks : core::ApplyTo::SelectedTracks);
+        left.setSelected(false);
+        left.setLocked(isLocked);
+        const auto progress = watch();
+        progress->whenCalled = [&] {
+            if (progress->calls.back().find("Event: 1") == std::string::npos)
+                return;
+            left.setSelected(true);
+            left.setLocked(false);
+        };
+
+        host.conform();
+
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+        EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+        EXPECT_EQ(host.contentOf(other), Texts{"bed 0-20"});
+        ASSERT_TRUE(host.undo());
+    }
 }
 
 TEST_P(HostRunTest, SeesNoTrackAnyMoreThatItsUndoTakesAway)
