@@ -355,6 +355,52 @@ TEST_P(HostRunTest, ChangesOnlyTheRangeToWhichItIsRestricted)
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "two 10-20", "three 30-40"}));
 }
 
+//     film       0       5         10         20
+//     before     |------ 1 --------|---- 2 ----|
+//     bounds             |---------|
+//     after      |-- 1 --|--- 2 ---|---- 2 ----|
+TEST_P(HostRunTest, ChangesNothingOutsideOfTheBoundsOfItsRequest)
+{
+    const bool wasRestricted = host.settings().restrictRange();
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(5.0), AdaptedHost::onClock(10.0)}), Result::Ok);
+    host.idle();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-5", "two 5-10", "two 10-20"}));
+    EXPECT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_EQ(host.settings().restrictRange(), wasRestricted);
+}
+
+TEST_P(HostRunTest, HasTheBoundsOfItsOwnRequestAlone)
+{
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(5.0), AdaptedHost::onClock(10.0)}), Result::Ok);
+    ASSERT_EQ(host.adapter().startCadrel(), Result::Ok);
+    host.idle();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostRunTest, TellsWhatStandsOnTheTracksThatItChanges)
+{
+    const auto other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"three", 30.0, 40.0);
+    const auto locked = host.addTrack(TypeWord::Audio, u"MX");
+    host.addSound(locked, u"four", 50.0, 60.0);
+    query<ITrackNode>(locked)->setFlag(TrackFlag::Lock, true);
+    using Material = std::vector<core::SecondsRange>;
+    const auto material = [this] {
+        Material found = host.adapter().getMaterial();
+        std::ranges::sort(found, {}, &core::SecondsRange::start);
+        return found;
+    };
+    const auto onFilm = [](double start, double end) {
+        return core::SecondsRange{AdaptedHost::onClock(start), AdaptedHost::onClock(end)};
+    };
+
+    EXPECT_EQ(material(), (Material{onFilm(0, 10), onFilm(10, 20), onFilm(30, 40)}));
+    host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
+    EXPECT_EQ(material(), Material());
+}
+
 TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
 {
     // The second half of the film goes far behind its end, and no event makes the project end there.

@@ -106,6 +106,8 @@ public:
     /// Those of them that a run could carry over: none that the user has locked, though a run frees what the system itself
     /// holds locked, and none on which runs alone write.
     std::vector<Track> availableTracks();
+    /// What stands on the tracks that a run changes: clips, markers and automation points.
+    std::vector<core::SecondsRange> material();
     /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
     /// alone, in which nobody else edits.
     void setUseTrackCache(bool flag);

@@ -138,6 +138,28 @@ std::wstring destinationName(const core::EventBase& event, const core::Settings&
 
 } // namespace
 
+std::vector<SecondsRange> Project::material()
+{
+    const double origin = timeOrigin();
+    std::vector<SecondsRange> stretches;
+    for (const Track& track : conformedTracks()) {
+        // Each run marks anew.
+        if (isMarkerTrackOfRuns(track))
+            continue;
+        for (const HostEvent& event : track.clipEvents()) {
+            const SecondsRange span = track.eventSpan(event);
+            stretches.push_back({origin + span.start, origin + span.end});
+        }
+        for (const auto& curve : curvesOf(*track.node())) {
+            for (const auto& point : childrenOf(*curve)) {
+                const double start = origin + point->getStart(nullptr);
+                stretches.push_back({start, start});
+            }
+        }
+    }
+    return stretches;
+}
+
 std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBase>& changeEvent)
 {
     const core::Framerate framerate = getFramerate();

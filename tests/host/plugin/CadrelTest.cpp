@@ -44,7 +44,8 @@ using cadrel::tests::ProcessResources;
 
 namespace {
 
-constexpr unsigned long Background = 0x2b2c2d;
+/// Of the band of the change EDL.
+constexpr unsigned long Band = 0x565d63;
 
 class OtherHostInfo : public Implements<OtherHostInfo, FObject, IHostInfo> {
 public:
@@ -485,7 +486,7 @@ TEST_F(CadrelTest, IsUnmappedAsAModuleOfAHostWithAJuceOfItsOwn)
         const standin::ModuleLoader loader(m_application, module, m_bundle);
         ASSERT_TRUE(isMapped("Cadrel.so"));
         ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
-        ASSERT_TRUE(turnUntil([this] { return m_windows.colourAt(400, 400) == Background; }));
+        ASSERT_TRUE(turnUntil([this] { return m_windows.colourAt(400, 400) == Band; }));
     };
     // What the first round opens for good, fonts for one, is the system's.
     loadAndUnload();
