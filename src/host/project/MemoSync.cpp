@@ -45,10 +45,10 @@ std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
     return ids;
 }
 
-void markFollowed(const HostEvent& copy)
+/// What was pasted from the real programme has never been marked.
+bool wasMarked(const HostEvent& copy)
 {
-    const std::uint32_t print = placePrintOf(*copy.node());
-    requireOk(copy.node()->setAttribute(AttributeKey::Followed, FVariant::integer(print), true));
+    return copy.node()->hasAttribute(AttributeKey::Followed) == Velmark::ResultOk;
 }
 
 /// Whether its timecodes are frames under that rate, which needn't be that of the project.
@@ -256,7 +256,7 @@ private:
         gone.settle();
         std::erase_if(edited, [&](const PlacedMemo& copy) {
             const std::optional<Memo> before = gone.take(memoOf(copy.event));
-            return (before || hasOneMemo(copy.id)) && carryOver(copy, sources, stretch, before);
+            return (before || hasOneMemo(copy)) && carryOver(copy, sources, stretch, before);
         });
         // What the user has written in the real programme meanwhile has no copy that he could have removed, and the memos of
         // those adrift stay.
@@ -292,10 +292,10 @@ private:
 
     /// Whether a copy that has come to a stretch was edited while nobody followed, or comes back to it. One that was pasted or
     /// comes from another stretch is a memo of its own.
-    bool hasOneMemo(std::int64_t id) const
+    bool hasOneMemo(const PlacedMemo& copy) const
     {
-        const auto count = m_counts.find(id);
-        return count != m_counts.end() && count->second == 1 && !m_knownIds.contains(id);
+        const auto count = m_counts.find(copy.id);
+        return count != m_counts.end() && count->second == 1 && !m_knownIds.contains(copy.id) && wasMarked(copy.event);
     }
 
     /// The memos that a stretch shows.
@@ -437,6 +437,12 @@ void MemoSync::remember(const Track& memos, const Previewed& previewed)
     }
     m_remembered = std::move(found);
     m_knownIds = std::move(ids);
+}
+
+void MemoSync::markFollowed(const HostEvent& copy)
+{
+    const std::uint32_t print = placePrintOf(*copy.node());
+    requireOk(copy.node()->setAttribute(AttributeKey::Followed, FVariant::integer(print), true));
 }
 
 bool MemoSync::isFollowed(const HostEvent& copy)

@@ -60,7 +60,9 @@ public:
     void forget();
     /// The same, but none counts as removed.
     void forgetCopies(const Events& events);
-    /// Whether a copy is as it was when its memo followed it last.
+    /// Notes on a copy what it is like now. To be done when it is written.
+    static void markFollowed(const HostEvent& copy);
+    /// Whether a copy is as it was when it was written or its memo followed it last.
     static bool isFollowed(const HostEvent& copy);
 
 private:

@@ -766,6 +766,19 @@ TEST_P(MemoSyncTest, AMemoThatIsPastedInTheFilmStaysWhereItsEventIsShownInPieces
     EXPECT_EQ(film(), Content{"pasted 12"});
 }
 
+TEST_P(MemoSyncTest, AMemoOfTheFilmThatIsPastedInThePreviewIsAMemoOfItsOwn)
+{
+    preview({tenSeconds()});
+    const auto cue = addMemo(u"cue", 12.0);
+
+    host.edit(u"Paste", [&] {
+        const auto pasted = addCopy(u"cue", 38.0);
+        HostEvent(host.handle(memos), pasted).setUserId(idOf(cue));
+    });
+
+    EXPECT_EQ(film(), (Content{"cue 12", "cue 18"}));
+}
+
 TEST_P(MemoSyncTest, OfTwoMemosWithTheSameIdTheOneGoesWhoseCopyIsRemoved)
 {
     addMemo(u"one", 12.0);
