@@ -214,15 +214,11 @@ Cuts loadCuts(DataModel& model, const GenerationOptions& options, Terminal& term
             std::move(newFiles.names),
             std::move(oldFiles.unread),
             std::move(newFiles.unread),
-<<<<<<< 679229a
             std::move(oldFiles.overlapping),
             std::move(newFiles.overlapping),
-            {}};
-=======
             {},
             std::move(oldFiles.titles),
             std::move(newFiles.titles)};
->>>>>>> f10d725
 }
 
 Cuts generateChangeEdl(DataModel& model, const GenerationOptions& options, Terminal& terminal)

@@ -43,11 +43,8 @@ struct Cuts {
 struct ReadFiles {
     std::vector<std::string> names;
     std::vector<UnreadOfFile> unread;
-<<<<<<< 679229a
     std::vector<std::string> overlapping;
-=======
     std::vector<std::string> titles; ///< each once
->>>>>>> f10d725
 };
 
 /// The files of both cuts.

@@ -894,18 +894,18 @@ TEST_P(HostRunTest, EmptiesNoTrackThatTheUserSelectsOrUnlocksMeanwhile)
     auto& chosen = dynamic_cast<standin::Track&>(*track);
     auto& left = dynamic_cast<standin::Track&>(*other);
     chosen.setSelected(true);
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") == std::string::npos)
+            return;
+        left.setSelected(true);
+        left.setLocked(false);
+    };
     for (const bool isLocked : {false, true}) {
         SCOPED_TRACE(isLocked);
         host.settings().setApplyTo(isLocked ? core::ApplyTo::AllTracks : core::ApplyTo::SelectedTracks);
         left.setSelected(false);
         left.setLocked(isLocked);
-        const auto progress = watch();
-        progress->whenCalled = [&] {
-            if (progress->calls.back().find("Event: 1") == std::string::npos)
-                return;
-            left.setSelected(true);
-            left.setLocked(false);
-        };
 
         host.conform();
 

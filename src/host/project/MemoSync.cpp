@@ -45,10 +45,10 @@ std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
     return ids;
 }
 
-void markFollowed(const HostEvent& copy)
+/// What was pasted from the real programme has never been marked.
+bool wasMarked(const HostEvent& copy)
 {
-    const std::uint32_t print = placePrintOf(*copy.node());
-    requireOk(copy.node()->setAttribute(AttributeKey::Followed, FVariant::integer(print), true));
+    return copy.node()->hasAttribute(AttributeKey::Followed) == Velmark::ResultOk;
 }
 
 /// Whether its timecodes are frames under that rate, which needn't be that of the project.
@@ -125,12 +125,6 @@ std::vector<MemoSync::Shown> MemoSync::stretchesOf(const Previewed& previewed)
 MemoSync::Memo MemoSync::memoOf(const HostEvent& event)
 {
     return {event.getUserId(), event.getName(), event.getStart(), event.getEnd()};
-}
-
-bool MemoSync::Remembered::contains(std::int64_t id) const
-{
-    const auto found = copies.lower_bound(firstOf(id));
-    return found != copies.end() && found->id == id;
 }
 
 /// Below all of its id and name.
@@ -211,15 +205,21 @@ MemoSync::Preview MemoSync::previewOf(const PlacedMemos& memos, const Previewed&
 /// What the memos do when the user has edited their copies.
 class MemoSync::Following {
 public:
-    Following(IHostContext* context, const Track& memos, const Preview& preview, IEditTransaction& transaction)
+    Following(IHostContext* context, const Track& memos, const Preview& preview, const std::set<std::int64_t>& knownIds,
+              IEditTransaction& transaction)
         : m_hostContext(context), m_memos(memos), m_preview(preview), m_adrift(idsOf(preview.adrift)),
-          m_transaction(transaction), m_newIds(memos)
+          m_knownIds(knownIds), m_transaction(transaction), m_newIds(memos)
     {
     }
 
     /// The memos have stood as placed. What the copies were like is null where that isn't known.
-    void follow(PlacedMemos placed, const std::function<const Remembered*(const Shown&)>& rememberedOf)
+    void follow(PlacedMemos placed, double previewStart,
+                const std::function<const Remembered*(const Shown&)>& rememberedOf)
     {
+        for (const PlacedMemo& memo : placed.all()) {
+            if (isBefore(memo.span.start, previewStart))
+                ++m_counts[memo.id];
+        }
         for (const Shown& shown : m_preview.shown) {
             if (hasChanged(shown.stretch.source)) {
                 placed = PlacedMemos(m_memos);
@@ -232,7 +232,7 @@ public:
 private:
     void followStretch(const PlacedMemos& placed, const Shown& shown, const Remembered* remembered)
     {
-        MemosById sources(sourcesOf(placed, shown.stretch, shown.copies));
+        MemosById sources(sourcesOf(placed, shown, remembered != nullptr), shown.stretch.source);
         if (remembered)
             followEdits(shown, sources, *remembered);
         else
@@ -256,10 +256,7 @@ private:
         gone.settle();
         std::erase_if(edited, [&](const PlacedMemo& copy) {
             const std::optional<Memo> before = gone.take(memoOf(copy.event));
-            // One that was pasted is a memo of its own. One of which nothing is known was edited while nobody followed.
-            if (!before && remembered.contains(copy.id))
-                return false;
-            return carryOver(copy, sources, stretch, before);
+            return (before || hasOneMemo(copy)) && carryOver(copy, sources, stretch, before);
         });
         // What the user has written in the real programme meanwhile has no copy that he could have removed, and the memos of
         // those adrift stay.
@@ -293,10 +290,18 @@ private:
         }
     }
 
-    /// The memos that a stretch shows.
-    static std::vector<PlacedMemo> sourcesOf(const PlacedMemos& memos, const Stretch& stretch,
-                                             const std::vector<PlacedMemo>& copies)
+    /// Whether a copy that has come to a stretch was edited while nobody followed, or comes back to it. One that was pasted or
+    /// comes from another stretch is a memo of its own.
+    bool hasOneMemo(const PlacedMemo& copy) const
     {
+        const auto count = m_counts.find(copy.id);
+        return count != m_counts.end() && count->second == 1 && !m_knownIds.contains(copy.id) && wasMarked(copy.event);
+    }
+
+    /// The memos that a stretch shows.
+    static std::vector<PlacedMemo> sourcesOf(const PlacedMemos& memos, const Shown& shown, bool isKnown)
+    {
+        const Stretch& stretch = shown.stretch;
         std::vector<PlacedMemo> found;
         std::vector<PlacedMemo> reaching;
         memos.visitTouching(stretch.source, [&](const PlacedMemo& memo) {
@@ -308,10 +313,10 @@ private:
         if (reaching.empty())
             return found;
         // A memo that only reaches into the stretch has its copy there, too.
-        const std::set<std::int64_t> copied = idsOf(copies);
+        const std::set<std::int64_t> copied = idsOf(shown.copies);
         std::set<std::int64_t> taken = idsOf(found);
         for (PlacedMemo& memo : reaching) {
-            if (copied.contains(memo.id) && taken.insert(memo.id).second)
+            if (copied.contains(memo.id) && (isKnown || taken.insert(memo.id).second))
                 found.push_back(std::move(memo));
         }
         return found;
@@ -391,14 +396,22 @@ private:
     const Track& m_memos;
     const Preview& m_preview;
     std::set<std::int64_t> m_adrift;
+    const std::set<std::int64_t>& m_knownIds;
+    std::map<std::int64_t, std::size_t> m_counts; ///< of the memos in the real programme, by their ids
     IEditTransaction& m_transaction;
     NewIds m_newIds;
     CoveredRanges m_changed; ///< since the memos were placed
 };
 
-void MemoSync::forgetCopies(const Events& events)
+void MemoSync::forget()
 {
     m_remembered.clear();
+    m_knownIds.clear();
+}
+
+void MemoSync::forgetCopies(const Events& events)
+{
+    forget();
     for (const auto& event : events)
         m_remembered.try_emplace(event);
 }
@@ -411,15 +424,25 @@ void MemoSync::remember(const Track& memos, const Previewed& previewed)
     if (placed.all().empty())
         return;
     auto found = m_remembered;
+    std::set<std::int64_t> ids;
     const Preview preview = previewOf(placed, previewed);
     const auto edited = editedSince(memos, preview.shown);
     for (const Shown& shown : preview.shown) {
         for (const PlacedMemo& copy : shown.copies) {
-            if (!edited.contains(copy.event.node()))
-                found[shown.event][shown.piece].copies.insert(memoOf(copy.event));
+            if (edited.contains(copy.event.node()))
+                continue;
+            found[shown.event][shown.piece].copies.insert(memoOf(copy.event));
+            ids.insert(copy.id);
         }
     }
     m_remembered = std::move(found);
+    m_knownIds = std::move(ids);
+}
+
+void MemoSync::markFollowed(const HostEvent& copy)
+{
+    const std::uint32_t print = placePrintOf(*copy.node());
+    requireOk(copy.node()->setAttribute(AttributeKey::Followed, FVariant::integer(print), true));
 }
 
 bool MemoSync::isFollowed(const HostEvent& copy)
@@ -454,9 +477,9 @@ void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTrans
     if (placed.all().empty())
         return;
     const Preview preview = previewOf(placed, previewed);
-    Following(m_hostContext, memos, preview, transaction).follow(std::move(placed), [this](const Shown& shown) {
-        return rememberedOf(shown);
-    });
+    Following(m_hostContext, memos, preview, m_knownIds, transaction)
+        .follow(std::move(placed), previewed.offset + previewed.moved,
+                [this](const Shown& shown) { return rememberedOf(shown); });
 }
 
 const MemoSync::Remembered* MemoSync::rememberedOf(const Shown& shown) const

@@ -57,10 +57,12 @@ public:
     /// is noted.
     void remember(const Track& memos, const Previewed& previewed);
     /// From now on the copies are compared with their memos, and their number tells what the user has removed or written.
-    void forget() { m_remembered.clear(); }
+    void forget();
     /// The same, but none counts as removed.
     void forgetCopies(const Events& events);
-    /// Whether a copy is as it was when its memo followed it last.
+    /// Notes on a copy what it is like now. To be done when it is written.
+    static void markFollowed(const HostEvent& copy);
+    /// Whether a copy is as it was when it was written or its memo followed it last.
     static bool isFollowed(const HostEvent& copy);
 
 private:
@@ -84,8 +86,6 @@ private:
     /// The copies in a stretch as they were.
     struct Remembered {
         std::set<Memo> copies;
-
-        bool contains(std::int64_t id) const;
     };
     class CopiesThatWere;
     /// A stretch with the copies that belong to it.
@@ -115,6 +115,7 @@ private:
     Velmark::IHostContext* m_hostContext;
     /// By event and piece.
     std::map<std::shared_ptr<core::EventBase>, std::map<std::size_t, Remembered>> m_remembered;
+    std::set<std::int64_t> m_knownIds; ///< of those copies
 };
 
 } // namespace cadrel::host

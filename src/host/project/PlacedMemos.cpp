@@ -29,10 +29,10 @@ HighestNumber PlacedMemos::endsOf(const std::vector<PlacedMemo>& memos)
     return HighestNumber(ends);
 }
 
-MemosById::MemosById(std::vector<PlacedMemo> memos)
+MemosById::MemosById(std::vector<PlacedMemo> memos, const core::SecondsRange& range)
 {
     for (PlacedMemo& memo : memos) {
-        m_indexes.emplace(memo.id, memo.span.start, m_memos.size());
+        m_indexes.emplace(memo.id, std::clamp(memo.span.start, range.start, range.end), m_memos.size());
         m_memos.emplace_back(std::move(memo));
     }
 }

@@ -50,13 +50,13 @@ private:
     HighestNumber m_ends;
 };
 
-/// Memos in an order, from which those of an id are taken.
+/// Memos of a range in an order, from which those of an id are taken.
 class MemosById {
 public:
-    explicit MemosById(std::vector<PlacedMemo> memos);
+    MemosById(std::vector<PlacedMemo> memos, const core::SecondsRange& range);
 
     std::size_t size() const { return m_indexes.size(); }
-    /// The one of that id that starts nearest to a time; nothing when there is none.
+    /// The one of that id of which the part in the range starts nearest to a time; nothing when there is none.
     std::optional<PlacedMemo> take(std::int64_t id, double start);
     /// Those that are left.
     std::vector<PlacedMemo> rest() const;

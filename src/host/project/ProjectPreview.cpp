@@ -114,6 +114,13 @@ void Project::rememberWritten()
     core::Framerate framerate;
     resultOf([&] { framerate = getFramerate(); });
     FirstFailure failure;
+    failure.ofStep([&] {
+        findMarkerTracks();
+        for (const HostEvent& memo : markerTrack(TrackRole::Memos).clipEvents()) {
+            if (!isBefore(memo.getStart(), *start + timeOrigin()))
+                MemoSync::markFollowed(memo);
+        }
+    });
     for (const Track& track : cadrelTracks()) {
         failure.ofStep([&] {
             const PreviewRecord record = PreviewRecord::ofContent(track, *start, framerate);
@@ -185,14 +192,20 @@ void Project::removeFollowed(IEditTransaction& transaction, double start)
     const Track& memos = markerTrack(TrackRole::Memos);
     const double begin = start + timeOrigin();
     std::set<std::int64_t> ids;
-    std::vector<HostEvent> followed;
-    for (HostEvent& memo : memos.clipEvents()) {
+    std::vector<Node> followed;
+    for (const HostEvent& memo : memos.clipEvents()) {
         if (!isBefore(memo.getEnd(), begin) && MemoSync::isFollowed(memo))
-            followed.push_back(std::move(memo));
+            followed.push_back(Node::share(memo.node()));
         else if (isBefore(memo.getStart(), begin))
             ids.insert(memo.getUserId());
     }
-    for (HostEvent& copy : followed) {
+    if (followed.empty())
+        return;
+    // What is as it was written goes with the stretch.
+    if (const auto record = PreviewRecord::keptBy(memos))
+        followed = record->others(std::move(followed));
+    for (const Node& node : followed) {
+        HostEvent copy(memos, node);
         const std::int64_t id = copy.getUserId();
         if (id > 0 && ids.contains(id))
             copy.remove(transaction);

@@ -617,7 +617,8 @@ void expectPrinted(const FormOf& formOf, const EdlFrames& oldCut, const EdlFrame
     ASSERT_EQ(NotesReplay(notes, oldCut, newCut).faults(), std::vector<std::string>());
     // What is doubted in broken cuts has tests of its own.
     for (const char* const side : {"old", "new"})
-        ASSERT_TRUE(notes.at(side).at("doubts").empty() && notes.at(side).at("unread").empty());
+        ASSERT_TRUE(notes.at(side).at("doubts").empty() && notes.at(side).at("unread").empty() &&
+                    notes.at(side).at("overlappingFiles").empty());
     const PrintedNotes printed(notes);
     const std::string text = joinedWords(formOf(".txt"));
     const std::string html = formOf(".html");
