@@ -8,9 +8,8 @@
 #include "app/console/Wording.h"
 #include "app/edl/ProjectClock.h"
 #include "core/edl/EventBase.h"
-#include "core/keep/KeepPlanner.h"
-#include "core/keep/KeptChangeList.h"
 #include "core/model/DataModel.h"
+#include "core/protect/RestrictedRange.h"
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
 #include "standin/project/Project.h"
@@ -29,42 +28,10 @@ using core::EventList;
 using core::FrameRange;
 using core::FrameRanges;
 using core::Framerate;
-using core::KeepContext;
-using core::KeepPlan;
-using core::KeepPlanner;
 using core::KeepRefusal;
-using core::KeptEvent;
-using core::SecondsRange;
-using core::Settings;
 using core::Timecode;
 
 namespace {
-
-/// While it lives, a run may change what lies between the bounds alone.
-class RestrictedRange {
-public:
-    RestrictedRange(Settings& settings, const SecondsRange& bounds)
-        : m_settings(settings), m_wasRestricted(settings.restrictRange()), m_former{settings.preserveMaterialBefore(),
-                                                                                    settings.preserveMaterialAfter()}
-    {
-        set(true, bounds);
-    }
-    RestrictedRange(const RestrictedRange&) = delete;
-    RestrictedRange& operator=(const RestrictedRange&) = delete;
-    ~RestrictedRange() { set(m_wasRestricted, m_former); }
-
-private:
-    void set(bool isRestricted, const SecondsRange& range)
-    {
-        m_settings.set(&Settings::restrictRange, isRestricted);
-        m_settings.set(&Settings::preserveMaterialBefore, range.start);
-        m_settings.set(&Settings::preserveMaterialAfter, range.end);
-    }
-
-    Settings& m_settings;
-    bool m_wasRestricted;
-    SecondsRange m_former;
-};
 
 /// While it lives, a change list that holds nothing has one event that a run passes over. A run takes the old sound away
 /// then, but doesn't begin without an event.
@@ -93,19 +60,6 @@ private:
     EventList& m_list;
     bool m_isNeeded;
 };
-
-KeepContext contextOf(const DataModel& model, const standin::Project& project)
-{
-    const Settings& settings = model.settings();
-    KeepContext context;
-    context.framerate = Timecode::framerate();
-    context.matchBy = settings.matchBy();
-    context.vfxPatterns = settings.vfxPatterns();
-    context.material = RunMaterial(project, settings).stretches();
-    if (settings.restrictRange())
-        context.preserve = SecondsRange{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()};
-    return context;
-}
 
 /// The texts of ranges of frames, in a message.
 class RangeTexts {
@@ -159,62 +113,20 @@ Failure failureOf(const KeepRefusal& refusal, const RangeTexts& texts, const std
             "make room for them, or give --force to let the cut win"};
 }
 
-/// The list of some events of a plan.
-EventList listOf(std::vector<KeptEvent> events, const DataModel& model)
-{
-    KeepPlan plan;
-    plan.events = std::move(events);
-    return core::keptChangeList(plan, model.newEdl(), model.settings().matchBy(), Timecode::framerate());
-}
-
-void sortByDestination(std::vector<KeptEvent>& events)
-{
-    std::sort(events.begin(), events.end(),
-              [](const KeptEvent& a, const KeptEvent& b) { return a.destination.start < b.destination.start; });
-}
-
-std::vector<KeptEvent> movedOf(const std::vector<KeptEvent>& events)
-{
-    std::vector<KeptEvent> moved;
-    std::copy_if(events.begin(), events.end(), std::back_inserter(moved),
-                 [](const KeptEvent& event) { return event.shift != 0; });
-    return moved;
-}
-
-SecondsRange intersect(const SecondsRange& a, const SecondsRange& b)
-{
-    return {std::max(a.start, b.start), std::min(a.end, b.end)};
-}
-
 } // namespace
 
 KeptRun::KeptRun(DataModel& model, const standin::Project& project, const ProjectClock& clock, Source source,
                  const std::string& inputs, const Doubt& doubt)
+    : m_run(model, RunMaterial(project, model.settings()).stretches(), source)
 {
-    const KeepContext context = contextOf(model, project);
-    const KeepPlanner planner(context);
-    m_plan = source == Source::Given ? planner.planGiven(model.changeEdl())
-                                     : planner.plan(model.oldEdl(), model.newEdl(), model.changeEdl());
-    const RangeTexts texts(clock, project.timeOrigin(), context.framerate);
-    for (const KeepRefusal& question : m_plan.questions)
+    const RangeTexts texts(clock, project.timeOrigin(), Timecode::framerate());
+    for (const KeepRefusal& question : plan().questions)
         doubt(failureOf(question, texts, inputs));
-    if (m_plan.refusal)
-        throw failureOf(*m_plan.refusal, texts, inputs);
-    if (m_plan.needsRun()) {
-        m_bounds = core::hullSeconds(m_plan, context.framerate);
-        if (context.preserve)
-            m_bounds = intersect(*m_bounds, *context.preserve);
-    }
-    if (source == Source::Given)
-        return;
-    std::vector<KeptEvent> all = m_plan.untouched;
-    all.insert(all.end(), m_plan.events.begin(), m_plan.events.end());
-    sortByDestination(all);
-    m_carried.append(listOf(std::move(all), model).release());
-    m_outside.append(listOf(movedOf(m_plan.untouched), model).release());
-    EventList kept = listOf(m_plan.events, model);
-    model.changeEdl().clear();
-    model.changeEdl().append(kept.release());
+    if (plan().refusal)
+        throw failureOf(*plan().refusal, texts, inputs);
+    m_carried.append(m_run.carried(model).release());
+    m_outside.append(m_run.outside(model).release());
+    m_run.putListInto(model);
     // Their numbers go on after those of the list.
     auto number = static_cast<std::uint32_t>(model.changeEdl().size());
     for (const auto& event : m_outside.events())
@@ -226,7 +138,7 @@ void KeptRun::apply(HostedProject& hosted) const
     if (!needsRun())
         return;
     DataModel& model = hosted.model();
-    const RestrictedRange restricted(model.settings(), *m_bounds);
+    const core::RestrictedRange restricted(model.settings(), bounds());
     const NothingCarried nothing(model.changeEdl());
     hosted.apply();
 }

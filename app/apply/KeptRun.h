@@ -3,12 +3,11 @@
 #pragma once
 
 #include "core/edl/EventList.h"
-#include "core/keep/KeepPlan.h"
+#include "core/protect/ProtectedRun.h"
 #include "core/time/SecondsRange.h"
 
 #include <cstddef>
 #include <functional>
-#include <optional>
 #include <string>
 #include <vector>
 
@@ -26,12 +25,10 @@ class HostedProject;
 class ProjectClock;
 struct Failure;
 
-/// A run that leaves alone what the new cut doesn't speak of: it is planned first, and then restricted to the stretch that
-/// has to change.
+/// A protected run of a project that is hosted, with what the user has to decide about it.
 class KeptRun {
 public:
-    /// Where the change EDL of the model is from.
-    enum class Source { Generated, Given };
+    using Source = core::ProtectedRun::Source;
 
     /// Gets what the user has to decide first, and throws it where he hasn't.
     using Doubt = std::function<void(const Failure&)>;
@@ -41,22 +38,21 @@ public:
     KeptRun(core::DataModel& model, const standin::Project& project, const ProjectClock& clock, Source source,
             const std::string& inputs, const Doubt& doubt);
 
-    bool needsRun() const { return m_bounds.has_value(); }
+    bool needsRun() const { return m_run.needsRun(); }
     /// What may change, in seconds of the project's clock. The run is needed.
-    const core::SecondsRange& bounds() const { return *m_bounds; }
+    const core::SecondsRange& bounds() const { return m_run.bounds(); }
     /// Does what has to be done. Afterwards the settings are as they were, whatever happens. Throws as
     /// HostedProject::apply.
     void apply(HostedProject& hosted) const;
 
-    const core::KeepPlan& plan() const { return m_plan; }
+    const core::KeepPlan& plan() const { return m_run.plan(); }
     /// All that has old sound in the new programme: the list that is carried out, and what stays. Empty for a given list.
     const core::EventList& carried() const { return m_carried; }
     /// What would move, but lies outside of what the user lets change.
     const core::EventList& outside() const { return m_outside; }
 
 private:
-    core::KeepPlan m_plan;
-    std::optional<core::SecondsRange> m_bounds;
+    core::ProtectedRun m_run;
     core::EventList m_carried;
     core::EventList m_outside;
 };

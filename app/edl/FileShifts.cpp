@@ -144,8 +144,9 @@ void FileShifts::apply(const std::string& file, EventList& events, Times times) 
     }
 }
 
-void requireParted(const std::list<LoadedEdl>& edls, bool isRefused, Terminal& terminal)
+std::vector<std::string> requireParted(const std::list<LoadedEdl>& edls, bool isRefused, Terminal& terminal)
 {
+    std::vector<std::string> overlapping;
     FrameRanges taken;
     for (const LoadedEdl& edl : edls) {
         const FrameRanges picture = pictureOf(edl);
@@ -155,10 +156,12 @@ void requireParted(const std::list<LoadedEdl>& edls, bool isRefused, Terminal& t
             if (isRefused)
                 throw failure;
             terminal.warn(failure);
+            overlapping.push_back(fileNameOf(edl.path));
         }
         taken.insert(taken.end(), picture.begin(), picture.end());
         taken = united(std::move(taken));
     }
+    return overlapping;
 }
 
 } // namespace cadrel::app

@@ -41,7 +41,7 @@ private:
 };
 
 /// Tells when picture of two files lies on the same timecode, with the shift that parts them: throws Failure where that
-/// is `refused`, and warns otherwise.
-void requireParted(const std::list<LoadedEdl>& edls, bool isRefused, Terminal& terminal);
+/// is `refused`, and warns otherwise. Gives the names of the files that lie on what those before them take.
+std::vector<std::string> requireParted(const std::list<LoadedEdl>& edls, bool isRefused, Terminal& terminal);
 
 } // namespace cadrel::app

@@ -189,8 +189,11 @@ ReadFiles loadCut(const std::vector<std::string>& files, EventList& events, cons
                   Terminal& terminal)
 {
     std::list<LoadedEdl> edls = EdlLoader(options, terminal).load(files);
-    requireParted(edls, options.refusesSameTimecodes || options.strict, terminal);
-    return takeEvents(std::move(edls), events);
+    std::vector<std::string> overlapping =
+        requireParted(edls, options.refusesSameTimecodes || options.strict, terminal);
+    ReadFiles read = takeEvents(std::move(edls), events);
+    read.overlapping = std::move(overlapping);
+    return read;
 }
 
 } // namespace
@@ -211,6 +214,8 @@ Cuts loadCuts(DataModel& model, const GenerationOptions& options, Terminal& term
             std::move(newFiles.names),
             std::move(oldFiles.unread),
             std::move(newFiles.unread),
+            std::move(oldFiles.overlapping),
+            std::move(newFiles.overlapping),
             {},
             std::move(oldFiles.titles),
             std::move(newFiles.titles)};

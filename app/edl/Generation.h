@@ -32,6 +32,8 @@ struct Cuts {
     std::vector<std::string> newNames;
     std::vector<UnreadOfFile> oldUnread;
     std::vector<UnreadOfFile> newUnread;
+    std::vector<std::string> oldOverlapping; ///< files with picture on the timecode of another file of their cut
+    std::vector<std::string> newOverlapping;
     std::vector<std::string> unmatched; ///< the events that the change EDL was made without, and why; the first of many
     std::vector<std::string> oldTitles; ///< that the files give themselves, in the bytes of the files; each once
     std::vector<std::string> newTitles;
@@ -41,6 +43,7 @@ struct Cuts {
 struct ReadFiles {
     std::vector<std::string> names;
     std::vector<UnreadOfFile> unread;
+    std::vector<std::string> overlapping;
     std::vector<std::string> titles; ///< each once
 };
 

@@ -34,8 +34,10 @@ constexpr int NewTop = 164;
 constexpr int NewBottom = 190;
 constexpr int Middle = (OldBottom + NewTop) / 2;
 
-/// A mark that is shorter than this part of the picture may be thinner than a pixel, and gets a stroke.
+/// A mark that is shorter than this part of the picture may be thinner than a pixel, and gets a stroke. Bands can be seen
+/// through, so that a stroke makes them darker, and they get one only where they need it at the full width of the page.
 constexpr std::int32_t ThinPart = 400;
+constexpr std::int32_t ThinPartOfABand = 1200;
 
 /// The box of the filter, which gives the hue, and the label on a line.
 struct KindLabel {
@@ -330,16 +332,16 @@ private:
             m_sink(box(*change.inNew, false, kind, id, title));
     }
 
-    std::string classOf(const std::string& kind, std::int32_t frames) const
+    std::string classOf(const std::string& kind, std::int32_t frames, std::int32_t thinPart) const
     {
-        return frames < m_width / ThinPart ? kind + " thin" : kind;
+        return frames < m_width / thinPart ? kind + " thin" : kind;
     }
 
     std::string box(const FrameSpan& frames, bool isOld, const std::string& kind, const std::string& ids,
                     const std::string& title) const
     {
-        return "<rect class=\"" + classOf(kind, frames.length) + "\" x=\"" + std::to_string(frames.start) + "\" y=\"" +
-               std::to_string(isOld ? OldTop : NewTop) + "\" width=\"" + std::to_string(frames.length) +
+        return "<rect class=\"" + classOf(kind, frames.length, ThinPart) + "\" x=\"" + std::to_string(frames.start) +
+               "\" y=\"" + std::to_string(isOld ? OldTop : NewTop) + "\" width=\"" + std::to_string(frames.length) +
                "\" height=\"" + std::to_string(OldBottom - OldTop) + "\"" + dataOf(ids) +
                (title.empty() ? "/>\n" : "><title>" + escaped(title) + "</title></rect>\n");
     }
@@ -357,7 +359,7 @@ private:
         const auto curve = [&point](std::int32_t fromX, std::int32_t toX, int toY) {
             return concatenated({"C", point(fromX, Middle), " ", point(toX, Middle), " ", point(toX, toY)});
         };
-        return "<path class=\"" + classOf(kind, inNew.length) + "\"" + dataOf(ids) + " d=\"M" +
+        return "<path class=\"" + classOf(kind, inNew.length, ThinPartOfABand) + "\"" + dataOf(ids) + " d=\"M" +
                point(inOld.start, OldBottom) + curve(inOld.start, inNew.start, NewTop) + "L" +
                point(inNew.end(), NewTop) + curve(inNew.end(), inOld.end(), OldBottom) + "Z\"/>\n";
     }
@@ -479,15 +481,14 @@ private:
         return kinds;
     }
 
-    /// The shots at the other end of a move, with a way to its step; empty for a kept stretch.
+    /// The shots at the other end of a move, which lead to its step; empty for a kept stretch.
     std::string moveOf(const NoteEntry& entry) const
     {
         const core::MoveEnd* const end = entry.moveEnd();
         if (end == nullptr)
             return {};
-        const std::string number = std::to_string(end->step);
         return concatenated(
-            {"<a href=\"#s", number, "\">step ", number, "</a>: ", escaped(m_words.describe(end->move).shot)});
+            {"<a href=\"#s", std::to_string(end->step), "\">", escaped(m_words.describe(end->move).shot), "</a>"});
     }
 
     /// The label stands before it already.

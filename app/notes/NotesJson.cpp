@@ -6,7 +6,7 @@
 #include "app/notes/SoundWording.h"
 #include "app/settings/SettingsReport.h"
 #include "core/edl/EventBase.h"
-#include "standin/file/JsonText.h"
+#include "util/JsonText.h"
 
 #include <nlohmann/json.hpp>
 #include <optional>
@@ -97,11 +97,11 @@ private:
     {
         json.append(R"({"kind":")").append(wordOf(change.kind));
         json.append(R"(","track":)").append(std::to_string(change.track + 1)).append(R"(,"trackName":)");
-        standin::appendJsonText(json, m_document.tracks.at(change.track).name);
+        util::appendJsonText(json, m_document.tracks.at(change.track).name);
         json.append(R"(,"on":)").append(change.isMarker ? R"("marker")" : R"("clip")").append(R"(,"name":)");
-        standin::appendJsonText(json, change.name);
+        util::appendJsonText(json, change.name);
         if (!change.part.empty())
-            standin::appendJsonText(json += R"(,"part":)", change.part);
+            util::appendJsonText(json += R"(,"part":)", change.part);
         if (change.kind != core::SoundChangeKind::Added)
             appendRange(json += R"(,"was":)", change.was);
         if (change.now)
@@ -121,7 +121,7 @@ private:
     void appendTime(std::string& json, double seconds) const
     {
         const double ofProject = seconds - m_document.clock.origin();
-        standin::appendJsonNumber(json += R"({"seconds":)", ofProject);
+        util::appendJsonNumber(json += R"({"seconds":)", ofProject);
         json.append(R"(,"timecode":")").append(m_document.clock.timecode(ofProject)).append(R"("})");
     }
 
@@ -180,6 +180,7 @@ private:
                 {"events", events.size()},
                 {"invalid", events.countInvalid()},
                 {"unread", toJson(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread)},
+                {"overlappingFiles", isNew ? m_document.cuts.newOverlapping : m_document.cuts.oldOverlapping},
                 {"doubts", std::move(doubts)}};
     }
 

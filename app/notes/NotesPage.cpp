@@ -34,7 +34,7 @@ svg:focus-visible, tr:focus-visible, button:focus-visible, summary:focus-visible
 .transition { --hue: var(--transition); }
 svg [data-rows] { fill: var(--hue); }
 path.kept { fill-opacity: .34; stroke-opacity: .34; } path.moved, path.doubled { fill-opacity: .62; stroke-opacity: .62; }
-svg .thin { stroke: var(--hue); stroke-width: 1; vector-effect: non-scaling-stroke; }
+svg .thin, path.moved, path.doubled { stroke: var(--hue); stroke-width: 1; vector-effect: non-scaling-stroke; }
 svg .on { fill-opacity: 1; stroke: var(--ink); stroke-opacity: 1; stroke-width: 1; vector-effect: non-scaling-stroke; }
 svg [data-rows]:hover { fill-opacity: .95; } svg .off { display: none; }
 .tools { display: flex; flex-wrap: wrap; gap: 6px 14px; align-items: center; margin: 14px 0 6px; font-size: 14px; }

@@ -359,6 +359,10 @@ std::vector<std::string> NotesWording::remarks() const
         lines.push_back(std::to_string(joined) + " trims that cancel out within " +
                         counted(static_cast<std::size_t>(m_document.layout.simplify), "frame") + " are joined");
     for (const bool isNew : {false, true}) {
+        for (const std::string& file : isNew ? m_document.cuts.newOverlapping : m_document.cuts.oldOverlapping)
+            lines.push_back(toPrintable(file, MostCharactersOfAName).text +
+                            " lies on the same timecode as another file of its cut: of what stands on top of each "
+                            "other, the one that starts later is seen");
         addDoubts(isNew, lines);
         addUnread(isNew, lines);
     }

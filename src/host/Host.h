@@ -6,6 +6,7 @@
 #include "core/edl/EventList.h"
 #include "core/notify/ChangeContextNotificationBase.h"
 #include "core/serialize/ByteArchive.h"
+#include "core/time/SecondsRange.h"
 #include "host/border/Teardown.h"
 #include "host/services/StringTranslator.h"
 #include "host/services/Transport.h"
@@ -94,6 +95,8 @@ public:
     /// All that keeps a run or a preview from being requested is answered, and nothing is thrown; what was requested before
     /// stays as it is. While one, or the end of a preview, is being carried out, the answer is Result::NotAvailable.
     util::Result::Type startCadrel() override;
+    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds) override;
+    std::vector<core::SecondsRange> getMaterial() override;
     util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                     std::uint32_t options) override;
     /// Result::Ok for no events, Result::InvalidArgument for more neighbours than events, Result::NoProject without a
@@ -219,6 +222,7 @@ private:
     void requireIdle() const;
     /// Makes sure that there is a preview offset, and throws what keeps a run from beginning.
     void prepareStart();
+    util::Result::Type requestRun(const std::optional<core::SecondsRange>& bounds);
     /// The one that is open.
     Velmark::IEditTransaction& openTransaction() const;
     void announce(const wchar_t* text);
@@ -236,6 +240,7 @@ private:
     std::shared_ptr<ProjectVideo> m_videoProvider; ///< never null
     bool m_processing = false;                     ///< from the begin of a transaction to the end of its commit
     bool m_runRequested = false;
+    std::optional<core::SecondsRange> m_runBounds; ///< of the run that was requested, where it has some
     bool m_previewRequested = false;
     std::optional<std::int32_t> m_served; ///< the action of the request that is being carried out
     core::EventList m_previewEvents{core::ListKind::Change};

@@ -77,6 +77,11 @@ std::wstring Host::getProjectName()
     return util::HostString(path.data()).wide();
 }
 
+std::vector<core::SecondsRange> Host::getMaterial()
+{
+    return m_currentProject ? m_currentProject->material() : std::vector<core::SecondsRange>();
+}
+
 core::MediaPoolInterface* Host::getMediaPool()
 {
     return m_currentProject ? &m_currentProject->mediaPool() : nullptr;

@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
+#include "core/protect/RestrictedRange.h"
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
@@ -102,10 +103,21 @@ void Host::tellDropped(const std::vector<std::int32_t>& actions)
 
 Result::Type Host::startCadrel()
 {
-    return resultOf([this] {
+    return requestRun(std::nullopt);
+}
+
+Result::Type Host::startCadrelWithin(const core::SecondsRange& bounds)
+{
+    return requestRun(bounds);
+}
+
+Result::Type Host::requestRun(const std::optional<core::SecondsRange>& bounds)
+{
+    return resultOf([&] {
         requireIdle();
         prepareStart();
         m_runRequested = true;
+        m_runBounds = bounds;
     });
 }
 
@@ -166,6 +178,9 @@ Result::Type Host::runCadrel()
         return Result::NoProject;
     Project& project = *held;
     const core::EventList& changeList = project.model().changeEdl();
+    std::optional<core::RestrictedRange> restricted;
+    if (m_runBounds)
+        restricted.emplace(project.model().settings(), *m_runBounds);
     return withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
         Counted<IActionManager> actions; // once the user has cancelled
         VideoWriting video = VideoWriting::Done;
@@ -289,7 +304,7 @@ void Host::tellOfLeftOut(const Project& project)
     const std::wstring whose =
         events.size() == 1 ? L"event " + first
                            : std::to_wstring(events.size()) + L" events, the first of them event " + first + L",";
-    showAlert(L"Material of " + whose + L" would stand before the project begins. It has been left out.");
+    showAlert(L"Material of " + whose + L" would stand before the project or its day begins. It has been left out.");
 }
 
 Result::Type Host::withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,

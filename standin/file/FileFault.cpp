@@ -2,9 +2,11 @@
 
 #include "standin/file/FileFault.h"
 
-#include "standin/file/JsonText.h"
+#include "util/JsonText.h"
 
 #include <algorithm>
+
+using cadrel::util::appendJsonText;
 
 namespace standin {
 

@@ -3,7 +3,7 @@
 #include "standin/file/JsonDocument.h"
 
 #include "standin/file/FileFault.h"
-#include "standin/file/JsonText.h"
+#include "util/JsonText.h"
 
 #include <nlohmann/json.hpp>
 
@@ -12,6 +12,9 @@
 #include <limits>
 #include <unordered_map>
 #include <utility>
+
+using cadrel::util::appendJsonNumber;
+using cadrel::util::appendJsonText;
 
 namespace standin {
 

@@ -3,10 +3,13 @@
 #include "standin/file/JsonMembers.h"
 
 #include "standin/file/FileFault.h"
-#include "standin/file/JsonText.h"
 #include "standin/project/Project.h"
+#include "util/JsonText.h"
 
 #include <algorithm>
+
+using cadrel::util::appendJsonNumber;
+using cadrel::util::appendJsonText;
 
 namespace standin {
 

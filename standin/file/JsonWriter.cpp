@@ -4,10 +4,13 @@
 
 #include "standin/file/FileFault.h"
 #include "standin/file/JsonDocument.h"
-#include "standin/file/JsonText.h"
+#include "util/JsonText.h"
 
 #include <algorithm>
 #include <utility>
+
+using cadrel::util::appendJsonNumber;
+using cadrel::util::appendJsonText;
 
 namespace standin {
 

@@ -493,6 +493,34 @@ TEST(Notes, WhatIsHealedDoubtedAndNotReadStandsInEveryForm)
         EXPECT_LE(columnsOf(line), 80) << line;
 }
 
+TEST(Notes, TwoFilesOnOneTimecodeAreARemarkInEveryForm)
+{
+    const TempFolder folder;
+    const std::string first = folder.write("r1.edl", oldCut());
+    const std::string beside =
+        folder.write("r2.edl", cut("001", "B001", "10:00:00:00 10:00:10:12", "01:00:30:00 01:00:40:12"));
+    // A frame on top of the last shot.
+    const std::string onTop =
+        folder.write("r3.edl", cut("001", "C001", "10:00:00:00 10:00:10:12", "01:00:29:23 01:00:30:00"));
+    const auto notes = [&](const std::string& form, const std::vector<std::string>& more) {
+        const std::string file = folder / ("notes" + form);
+        std::vector<std::string> arguments{"notes",       "--new",  first,    "-o",    file,
+                                           "--overwrite", "--rate", "24 fps", "--old", first};
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        EXPECT_EQ(runCadrel(arguments).status, 0);
+        return form == ".pdf" ? textOfPdf(file) : contentOf(file);
+    };
+    const std::string remark = "r3.edl lies on the same timecode as another file of its cut";
+
+    for (const char* const form : {".txt", ".html", ".pdf"}) {
+        EXPECT_NE(unbroken(notes(form, {beside, onTop})).find(remark), std::string::npos) << form;
+        EXPECT_EQ(unbroken(notes(form, {beside})).find("lies on the same timecode"), std::string::npos) << form;
+    }
+    const json cuts = json::parse(notes(".json", {beside, onTop}));
+    EXPECT_EQ(cuts.at("old").at("overlappingFiles"), json({"r3.edl"}));
+    EXPECT_EQ(cuts.at("new").at("overlappingFiles"), json::array());
+}
+
 TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
 {
     // 20 s of new picture come first, so that the last shot is at 00:00:10:00 when it is to be moved.

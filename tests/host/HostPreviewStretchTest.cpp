@@ -19,6 +19,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cmath>
 #include <functional>
 #include <initializer_list>
 #include <limits>
@@ -822,6 +823,50 @@ TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheBeginOfTheHostsTim
     EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
     EXPECT_EQ(host.contentOf(track), Texts{"one 0-6"});
     EXPECT_EQ(standin::tests::childrenOf(*track)[0]->getSourceOffset(nullptr), 4.0);
+}
+
+// Four frames of a clip that hangs over would stand before 00:00:00:00. The last seconds of the day before the preview stretch
+// are the user's.
+TEST_P(HostPreviewAtTheBeginOfTheClock, WritesNothingBeforeTheDayWhereTheProjectBeginsEarlier)
+{
+    constexpr double Origin = -10.0;
+    AdaptedHost host(Origin);
+    const Node track = host.addTrack(TypeWord::Audio, u"DX");
+    const auto addSound = [&](const char16_t* name, double start, double end) {
+        host.addClip(track, name, start - Origin, end - Origin);
+    };
+    const auto inFrames = [](double hostSeconds) { return std::round((hostSeconds + Origin) * 25.0) / 25.0; };
+    const auto content = [&] {
+        std::vector<Span> spans;
+        for (const Node& child : standin::tests::childrenOf(*track))
+            spans.emplace_back(inFrames(child->getStart(nullptr)), inFrames(child->getEnd(nullptr)));
+        return spans;
+    };
+    using Spans = std::vector<Span>;
+    addSound(u"leader", -8.0, -3.0);
+    addSound(u"one", 90.0, 105.0);
+    addSound(u"late", Day - 4.0, Day - 0.04);
+    const Spans film = content();
+    const bool isRestricted = GetParam() == 0.0;
+    host.switchMarkersOff();
+    host.settings().setIncludeOverhangingAudioEvents(true);
+    host.settings().setRestrictRange(isRestricted);
+    host.settings().setPreserveMaterial(Origin, 300.0);
+    host.carryOver("00:01:30:04", "00:01:45:00", "00:00:00:00", "00:00:14:21");
+
+    host.adapter().setPreviewActive(true);
+    host.preview(host.model().changeEdl());
+    EXPECT_EQ(content(), (Spans{{-8.0, -3.0}, {90.0, 105.0}, {Day - 4.0, Day - 0.04}, {Day, Day + 14.84}}));
+    host.adapter().setPreviewActive(false);
+    EXPECT_EQ(content(), film);
+    EXPECT_EQ(host.alerts->messages.size(), 1U) << "The four frames are left out.";
+
+    host.conform();
+    Spans conformed{{-8.0, -3.0}, {0.0, 14.84}};
+    if (isRestricted)
+        conformed.emplace_back(Day - 4.0, Day - 0.04);
+    EXPECT_EQ(content(), conformed);
+    EXPECT_EQ(host.alerts->messages.size(), 2U);
 }
 
 // Locks.

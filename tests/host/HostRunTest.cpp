@@ -8,6 +8,7 @@
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
+#include "standin/project/Track.h"
 #include "standin/services/IdleManager.h"
 #include "tests/support/core/RecordingListener.h"
 #include "tests/support/host/AdaptedHost.h"
@@ -352,6 +353,52 @@ TEST_P(HostRunTest, ChangesOnlyTheRangeToWhichItIsRestricted)
     host.conform();
 
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "two 10-20", "three 30-40"}));
+}
+
+//     film       0       5         10         20
+//     before     |------ 1 --------|---- 2 ----|
+//     bounds             |---------|
+//     after      |-- 1 --|--- 2 ---|---- 2 ----|
+TEST_P(HostRunTest, ChangesNothingOutsideOfTheBoundsOfItsRequest)
+{
+    const bool wasRestricted = host.settings().restrictRange();
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(5.0), AdaptedHost::onClock(10.0)}), Result::Ok);
+    host.idle();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-5", "two 5-10", "two 10-20"}));
+    EXPECT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_EQ(host.settings().restrictRange(), wasRestricted);
+}
+
+TEST_P(HostRunTest, HasTheBoundsOfItsOwnRequestAlone)
+{
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(5.0), AdaptedHost::onClock(10.0)}), Result::Ok);
+    ASSERT_EQ(host.adapter().startCadrel(), Result::Ok);
+    host.idle();
+
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostRunTest, TellsWhatStandsOnTheTracksThatItChanges)
+{
+    const auto other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"three", 30.0, 40.0);
+    const auto locked = host.addTrack(TypeWord::Audio, u"MX");
+    host.addSound(locked, u"four", 50.0, 60.0);
+    query<ITrackNode>(locked)->setFlag(TrackFlag::Lock, true);
+    using Material = std::vector<core::SecondsRange>;
+    const auto material = [this] {
+        Material found = host.adapter().getMaterial();
+        std::ranges::sort(found, {}, &core::SecondsRange::start);
+        return found;
+    };
+    const auto onFilm = [](double start, double end) {
+        return core::SecondsRange{AdaptedHost::onClock(start), AdaptedHost::onClock(end)};
+    };
+
+    EXPECT_EQ(material(), (Material{onFilm(0, 10), onFilm(10, 20), onFilm(30, 40)}));
+    host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
+    EXPECT_EQ(material(), Material());
 }
 
 TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
@@ -808,7 +855,8 @@ TEST_P(HostRunTest, TellsWhatWouldStandBeforeTheProjectBegins)
 
         host.conform();
 
-        const Entries told{u"Material of event 2 would stand before the project begins. It has been left out."};
+        const Entries told{
+            u"Material of event 2 would stand before the project or its day begins. It has been left out."};
         EXPECT_EQ(host.alerts->messages, at.isTold ? told : Entries());
         EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
         ASSERT_TRUE(host.undo());
@@ -828,8 +876,8 @@ TEST_P(HostRunTest, TellsOfHowManyEventsSomethingWouldStandBeforeTheProjectBegin
 
     host.conform();
     const Entries told{
-        u"Material of 2 events, the first of them event 2, would stand before the project begins. It has "
-        u"been left out."};
+        u"Material of 2 events, the first of them event 2, would stand before the project or its day begins. "
+        u"It has been left out."};
     EXPECT_EQ(host.alerts->messages, told);
 
     ASSERT_TRUE(host.undo());
@@ -837,6 +885,35 @@ TEST_P(HostRunTest, TellsOfHowManyEventsSomethingWouldStandBeforeTheProjectBegin
     host.idle();
     host.conform();
     EXPECT_EQ(host.alerts->messages, told) << "There is room for all of it, and nothing is told again.";
+}
+
+TEST_P(HostRunTest, EmptiesNoTrackThatTheUserSelectsOrUnlocksMeanwhile)
+{
+    const auto other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"bed", 0.0, 20.0);
+    auto& chosen = dynamic_cast<standin::Track&>(*track);
+    auto& left = dynamic_cast<standin::Track&>(*other);
+    chosen.setSelected(true);
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") == std::string::npos)
+            return;
+        left.setSelected(true);
+        left.setLocked(false);
+    };
+    for (const bool isLocked : {false, true}) {
+        SCOPED_TRACE(isLocked);
+        host.settings().setApplyTo(isLocked ? core::ApplyTo::AllTracks : core::ApplyTo::SelectedTracks);
+        left.setSelected(false);
+        left.setLocked(isLocked);
+
+        host.conform();
+
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+        EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+        EXPECT_EQ(host.contentOf(other), Texts{"bed 0-20"});
+        ASSERT_TRUE(host.undo());
+    }
 }
 
 TEST_P(HostRunTest, SeesNoTrackAnyMoreThatItsUndoTakesAway)

@@ -93,7 +93,7 @@ protected:
         const auto& open = m_application.views().windows();
         return open.empty() ? nullptr : open.front().get();
     }
-    bool isDrawn() { return m_windows.colourAt(400, 400) == Background; }
+    bool isDrawn() { return m_windows.colourAt(400, 400) == Band; }
 
     /// What the user has been told, a line each, and was not asked for before.
     std::string messages()
@@ -104,7 +104,8 @@ protected:
     }
 
 private:
-    static constexpr unsigned long Background = 0x2b2c2d;
+    /// Of the band of the change EDL.
+    static constexpr unsigned long Band = 0x565d63;
 
     std::ostringstream m_messages;
 

@@ -20,6 +20,7 @@ class EventBase;
 class EventList;
 class MediaPoolInterface;
 class ProgressHandlerBase;
+struct SecondsRange;
 class Settings;
 
 /// The engine. It implements a run in terms of operations on the project, which a subclass implements. It knows nothing
@@ -37,6 +38,11 @@ public:
 
     /// Requests a run of the change list and returns at once.
     virtual util::Result::Type startCadrel() = 0;
+    /// Likewise, but the run changes nothing outside of the bounds, in seconds of the project's clock.
+    virtual util::Result::Type startCadrelWithin(const SecondsRange& bounds) = 0;
+    /// Where clips, markers and automation points stand on the tracks that a run changes, in seconds of the project's clock;
+    /// an instant begins where it ends. In any order.
+    virtual std::vector<SecondsRange> getMaterial() = 0;
     /// Previews `events`. It does what `run` does, except that it doesn't call completeCadrel. It writes only markers
     /// that reach into the stretch from the start of the first event to the end of the last event that isn't left out.
     /// Without events it writes no markers. `first` and `last` are the numbers of neighbours at either end, `options`

@@ -17,8 +17,8 @@ public:
     /// In UTF-8.
     void setSuffix(const std::string& suffix) { m_suffix = suffix; }
 
-    /// As many steps lead to the same number as if they were one, with 15 digits: three steps of 0.1 to 0.3, three of a third
-    /// to 1.
+    /// Several steps in a row are added as one, so that nothing is lost by rounding: three steps of 0.1 lead to 0.3, three of a
+    /// third to 1, with 15 digits.
     void stepUp() { step(1.0); }
     void stepDown() { step(-1.0); }
     /// Reads a number. A text that is none reads as 0.

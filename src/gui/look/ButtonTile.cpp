@@ -10,6 +10,9 @@ namespace {
 
 constexpr float OuterCorner = 2.0F;
 constexpr float InnerCorner = 1.5F;
+/// The bar of a tile that is on, and how far it stays off the sides.
+constexpr float BarHeight = 2.0F;
+constexpr float BarInset = 4.0F;
 
 } // namespace
 
@@ -32,6 +35,10 @@ void ButtonTile::draw(juce::Graphics& graphics, juce::Rectangle<float> area) con
     graphics.setGradientFill(juce::ColourGradient::vertical(top.withMultipliedAlpha(opacity), inner.getY(),
                                                             bottom.withMultipliedAlpha(opacity), inner.getBottom()));
     graphics.fillRoundedRectangle(inner, InnerCorner);
+    if (isOn) {
+        graphics.setColour(juce::Colours::black.withAlpha(opacity));
+        graphics.fillRect(inner.reduced(BarInset, 1.0F).removeFromBottom(BarHeight));
+    }
     if (hasFocus)
         drawFocusRing(graphics, inner, InnerCorner);
 }

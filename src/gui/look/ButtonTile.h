@@ -12,6 +12,7 @@ struct ButtonTile {
     juce::Colour bottom;
     bool isEnabled = true;
     bool hasFocus = false; ///< a ring inside of the edge
+    bool isOn = false;     ///< a dark bar at the lower edge, for those who can't tell the colours apart
 
     /// The tile of a button that is neither on nor pressed.
     static ButtonTile normal();

@@ -12,8 +12,8 @@ namespace cadrel::gui {
 /// too. Each window holds one `juce::SharedResourcePointer<LookAndFeel>`: all share one look and feel, which goes with the
 /// last of them.
 ///
-/// JUCE calls all of these. What draws drops its failures. What answers has none: the fonts are those of the table, the
-/// typefaces are there since the start, and a tick is a few lines.
+/// JUCE calls all of these. Those that draw run inside the guard. Those that return something can't fail: the fonts are those of
+/// the table, the typefaces are there since the start, and a tick is a few lines.
 class LookAndFeel : public juce::LookAndFeel_V2 {
 public:
     LookAndFeel();

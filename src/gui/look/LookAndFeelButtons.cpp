@@ -51,6 +51,7 @@ void LookAndFeel::drawButtonBackground(juce::Graphics& graphics, juce::Button& b
         }
         ButtonTile tile = tileOf(button, isDown);
         tile.isEnabled = button.isEnabled();
+        tile.isOn = button.getToggleState();
         tile.hasFocus = button.hasKeyboardFocus(false);
         tile.draw(graphics, button.getLocalBounds().toFloat());
     });

@@ -18,7 +18,7 @@ constexpr float MenuFontHeight = 16.0F;
 constexpr float BlockShare = 0.25F;
 constexpr unsigned BlockPeriod = 1500;
 /// The free space that a sort arrow takes at the end of a header.
-constexpr float SortArrow = 16.0F;
+constexpr float SortArrow = 14.0F;
 
 /// The part of a progress bar that is filled: up to the progress, or a moving block when nobody knows it.
 juce::Rectangle<float> doneOf(juce::Rectangle<float> bar, double progress)
@@ -212,7 +212,7 @@ void LookAndFeel::drawTableHeaderColumn(juce::Graphics& graphics, juce::TableHea
                  getFont(7), juce::Colours::black, true);
         if (isSorted) {
             graphics.setColour(juce::Colours::black);
-            graphics.fillPath(sortArrow({field.getRight() - 7.0F, field.getCentreY()}, !isForwards));
+            graphics.fillPath(sortArrow({field.getRight() - 5.0F, field.getCentreY()}, !isForwards));
         }
     });
 }

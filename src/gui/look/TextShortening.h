@@ -26,7 +26,7 @@ public:
 
     /// How many texts it remembers at most. When there are more, it forgets them all.
     static constexpr std::size_t Capacity = 4096;
-    /// How many letters of a text it remembers. Wide boxes have room for fewer.
+    /// How many letters of a text it remembers. Hardly any box has room for so many.
     static constexpr std::size_t LongestRemembered = 256;
     std::size_t size() const { return m_cut.size(); }
 

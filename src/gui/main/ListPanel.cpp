@@ -41,6 +41,23 @@ void setBounds(juce::Component& component, const MainLayout::Box& box)
     component.setBounds(box.x, box.y, box.width, box.height);
 }
 
+/// While it lives, a listener doesn't hear of a table.
+class Unheard {
+public:
+    Unheard(std::shared_ptr<EventTableModel> model, EventTableModel::Listener* listener)
+        : m_model(std::move(model)), m_listener(listener)
+    {
+        m_model->removeListener(m_listener);
+    }
+    Unheard(const Unheard&) = delete;
+    Unheard& operator=(const Unheard&) = delete;
+    ~Unheard() { m_model->addListener(m_listener); }
+
+private:
+    std::shared_ptr<EventTableModel> m_model;
+    EventTableModel::Listener* m_listener;
+};
+
 } // namespace
 
 ListPanel::ListPanel(std::int32_t listKind, const char* tableName, const std::wstring& title,
@@ -73,18 +90,18 @@ void ListPanel::place(const MainLayout& layout)
 
 void ListPanel::show(core::DataModel& model, core::CadrelerBase* engine, EventTableModel::Listener* listener)
 {
-    if (m_model && m_dataModel == &model) {
-        m_model->removeListener(listener);
-        reload();
-    } else {
+    const bool isNew = !m_model || m_dataModel != &model;
+    if (isNew) {
         m_model.reset();
         m_model = std::make_shared<EventTableModel>(m_table, CutCommands::listOf(model, m_listKind), model);
         m_dataModel = &model;
     }
+    const Unheard unheard(m_model, listener);
+    if (!isNew)
+        reload();
     m_model->setEngine(engine);
     if (const auto key = StoredTable(model, m_listKind).sortKey())
         m_model->applySort(key->column, key->forwards);
-    m_model->addListener(listener);
     updateCounters();
 }
 
@@ -129,8 +146,18 @@ void ListPanel::updateCounters()
             ListCounters::of(CutCommands::listOf(*m_dataModel, m_listKind), m_model->getSelectedRows().count()));
 }
 
+void ListPanel::updateSelected()
+{
+    if (!m_model)
+        return;
+    ListCounters counters = m_counters;
+    counters.selected = m_model->getSelectedRows().count();
+    showCounters(counters);
+}
+
 void ListPanel::showCounters(const ListCounters& counters)
 {
+    m_counters = counters;
     m_values.at(Total).setText(juce::String(static_cast<juce::uint64>(counters.total)), juce::dontSendNotification);
     m_values.at(Selected).setText(juce::String(static_cast<juce::uint64>(counters.selected)),
                                   juce::dontSendNotification);

@@ -61,6 +61,8 @@ public:
     EventTableModel* model() { return m_model.get(); }
     bool isOf(const EventTableModel& model) const { return m_model.get() == &model; }
     void updateCounters();
+    /// The list is as it was.
+    void updateSelected();
 
 private:
     void showCounters(const ListCounters& counters);
@@ -69,6 +71,7 @@ private:
     EventTable m_table;
     std::array<juce::Label, MainLayout::CounterCount> m_labels;
     std::array<juce::Label, MainLayout::CounterCount> m_values;
+    ListCounters m_counters;
     core::DataModel* m_dataModel = nullptr;
     std::shared_ptr<EventTableModel> m_model;
 };

@@ -35,10 +35,12 @@ MainGui::MainGui()
     setOpaque(true);
     setWantsKeyboardFocus(true);
     addAndMakeVisible(m_controls);
-    for (Sheet* const sheet : std::initializer_list<Sheet*>{&m_videosDialog, &m_fileDialog, &m_editDialog}) {
+    for (Sheet* const sheet :
+         std::initializer_list<Sheet*>{&m_settingsDialog, &m_videosDialog, &m_fileDialog, &m_editDialog}) {
         sheet->setBeneath(&m_controls);
         addChildComponent(sheet);
     }
+    m_settingsDialog.addComponentListener(this);
     m_fileDialog.addComponentListener(this);
     for (std::size_t index = 0; index < MainButtonCount; ++index)
         m_controls.button(static_cast<MainButton>(index)).addListener(this);
@@ -51,6 +53,7 @@ MainGui::~MainGui()
     guardSystem([this] { stopPreview(); });
     if (m_notifier)
         m_notifier->removeListener(this);
+    m_settingsDialog.removeComponentListener(this);
     m_fileDialog.removeComponentListener(this);
     guardSystem([this] { letGoOfModel(); });
 }
@@ -90,6 +93,7 @@ void MainGui::resized()
 {
     guardSystem([this] {
         m_controls.setBounds(getLocalBounds());
+        m_settingsDialog.setBounds(getLocalBounds());
         m_videosDialog.setBounds(getLocalBounds());
         m_fileDialog.setBounds(getLocalBounds());
     });
@@ -156,7 +160,7 @@ void MainGui::carryOut(MainButton button)
     case MainButton::Videos:
         return m_videosDialog.setVisible(true);
     case MainButton::Settings:
-        break;
+        return m_settingsDialog.setVisible(true);
     }
 }
 
@@ -183,7 +187,7 @@ void MainGui::selectionChanged(EventTableModel& model)
     ListPanel* const panel = m_controls.panelOf(model);
     if (!panel || !m_model)
         return;
-    m_controls.forEachPanel([](ListPanel& each) { each.updateCounters(); });
+    m_controls.forEachPanel([](ListPanel& each) { each.updateSelected(); });
     panel->storeSelection();
     if (panel->listKind() != ListKind::Change)
         return;

@@ -7,6 +7,7 @@
 #include "gui/files/FileDialog.h"
 #include "gui/look/LookAndFeel.h"
 #include "gui/main/MainControls.h"
+#include "gui/settings/SettingsDialog.h"
 #include "gui/table/EventTableModel.h"
 #include "gui/video/NewVideosDialog.h"
 
@@ -23,6 +24,7 @@ class ActionChangeContext;
 class CadrelerBase;
 class ChangeContextNotificationBase;
 class DataModel;
+class ProtectedRun;
 } // namespace cadrel::core
 
 namespace cadrel::gui {
@@ -79,6 +81,7 @@ private:
 
     void handle(const core::ChangeContext& context);
     void setModel(core::DataModel* model);
+    void closeSheets();
     void letGoOfModel();
     void showModel();
     void showList(std::int32_t listKind);
@@ -103,6 +106,16 @@ private:
     void clear(std::int32_t listKind);
     void save();
     void start();
+    /// How a run is to treat what the change list doesn't carry.
+    enum class Protection {
+        Plain, ///< as the list says
+        Kept,
+        None, ///< there is no run
+    };
+    /// Asks the user where there is something to ask. None also when everything has changed meanwhile.
+    Protection askForProtection();
+    core::ProtectedRun plannedRun() const;
+    void requestRun(Protection protection);
     void switchPreview(bool isOn);
     /// False when the model is another one now.
     bool stopPreview();
@@ -126,6 +139,7 @@ private:
     bool m_isModelChanging = false;
     std::wstring m_saveFolder;
     MainControls m_controls;
+    SettingsDialog m_settingsDialog;
     NewVideosDialog m_videosDialog;
     FileDialog m_fileDialog;
     TcEditDialog m_editDialog;

@@ -30,6 +30,8 @@ void MainGui::handle(const ChangeContext& context)
     switch (context.type) {
     case ChangeContext::DataModelChanged:
         return setModel(static_cast<const core::DataModelChangeContext&>(context).dataModel);
+    case ChangeContext::SettingsChanged:
+        return m_settingsDialog.setSettings(m_model ? &m_model->settings() : nullptr);
     case ChangeContext::EventListChanged:
         return listReplaced(static_cast<const core::EventListChangeContext&>(context).listKind);
     case ChangeContext::VideoListChanged:
@@ -50,27 +52,40 @@ void MainGui::setModel(core::DataModel* model)
     const juce::ScopedValueSetter<bool> changing(m_isModelChanging, true);
     m_isRunRequested = false;
     m_isPreviewTold = false;
-    m_editDialog.modelChanged();
+    guardSystem([this] { m_editDialog.modelChanged(); });
     if (model != m_model || !model) {
-        m_videosDialog.setVisible(false);
+        closeSheets();
         letGoOfModel();
     }
     m_model = model;
-    m_fileDialog.setModel(m_model, m_model && m_engine ? m_engine->getProjectName() : std::wstring());
+    guardSystem(
+        [this] { m_fileDialog.setModel(m_model, m_model && m_engine ? m_engine->getProjectName() : std::wstring()); });
+    guardSystem([this] { m_settingsDialog.setSettings(m_model ? &m_model->settings() : nullptr); });
     guardSystem([this] { showVideoList(); });
     if (m_model)
-        showModel();
-    showPreviewState();
+        guardSystem([this] { showModel(); });
+    guardSystem([this] { showPreviewState(); });
     updateEnablement();
 }
 
+/// What was begun isn't stored in a model that goes.
+void MainGui::closeSheets()
+{
+    guardSystem([this] {
+        m_settingsDialog.setSettings(nullptr);
+        m_settingsDialog.setVisible(false);
+    });
+    guardSystem([this] { m_videosDialog.setVisible(false); });
+}
+
+/// Without a project there is no frame rate either.
 void MainGui::letGoOfModel()
 {
-    m_controls.forEachPanel([this](ListPanel& panel) { panel.forget(this); });
-    m_controls.timeline().setEvents(core::EventList());
-    m_controls.video().setActive(false);
-    m_controls.setOn(MainButton::Source, true);
     m_model = nullptr;
+    m_controls.forEachPanel([this](ListPanel& panel) { guardSystem([&] { panel.forget(this); }); });
+    guardSystem([this] { m_controls.timeline().setEvents(core::EventList()); });
+    guardSystem([this] { m_controls.video().setActive(false); });
+    m_controls.setOn(MainButton::Source, true);
 }
 
 void MainGui::showModel()
@@ -93,7 +108,11 @@ void MainGui::showModel()
 
 void MainGui::updateEnablement()
 {
+    const bool wasEnabled = isEnabled();
     setEnabled(m_model && !m_isRunRequested);
+    // A window that is disabled has no keyboard focus.
+    if (!wasEnabled && isEnabled() && !getCurrentlyFocusedComponent() && getPeer() && getPeer()->isFocused())
+        focusChangeTable();
 }
 
 // ---- Lists ---------------------------------------------------------------------------------------------------------
@@ -150,7 +169,24 @@ void MainGui::showSelection()
     showVideo();
 }
 
-void MainGui::showVideo() {}
+void MainGui::showVideo()
+{
+    VideoDisplay& display = m_controls.video();
+    const auto frames = ShownFrames::of(selectedChanges(), m_controls.isOn(MainButton::Out));
+    guardSystem([&] {
+        display.setActive(frames.has_value());
+        if (frames)
+            display.setFrames(frames->oldTime, frames->newTime, frames->isLast);
+    });
+}
+
+void MainGui::showVideoList()
+{
+    core::MediaPoolInterface* const pool = m_model && m_engine ? m_engine->getMediaPool() : nullptr;
+    m_videosDialog.setVideoList(m_model ? &m_model->videoList() : nullptr, pool);
+    if (m_model && m_engine)
+        m_videosDialog.setTimeOrigin(m_engine->getTimeOrigin());
+}
 
 // ---- The preview, and runs -----------------------------------------------------------------------------------------
 

@@ -5,12 +5,16 @@
 #include "core/conform/CadrelerBase.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
+#include "core/model/DataModelCommandCreator.h"
 #include "core/notify/ChangeContext.h"
+#include "core/protect/ProtectedRun.h"
+#include "core/time/Timecode.h"
 #include "gui/files/EdlFolder.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ShownText.h"
 #include "gui/main/CutCommands.h"
 #include "gui/main/EngineAnswers.h"
+#include "gui/main/KeepQuestion.h"
 #include "gui/main/MainCommands.h"
 #include "gui/main/MainGui.h"
 #include "gui/main/SavedChangeEdl.h"
@@ -103,8 +107,58 @@ void MainGui::start()
     if (!stopPreview())
         return;
     m_controls.setOn(MainButton::Source, true);
+    const Protection protection = askForProtection();
+    if (protection != Protection::None)
+        requestRun(protection);
+}
+
+core::ProtectedRun MainGui::plannedRun() const
+{
+    return {*m_model, m_engine->getMaterial(), core::ProtectedRun::sourceOf(*m_model)};
+}
+
+MainGui::Protection MainGui::askForProtection()
+{
+    const core::ProtectedRun run = plannedRun();
+    const KeepQuestion question(run, core::Timecode::framerate());
+    if (!question.isNeeded())
+        return Protection::Plain;
+    // The first button is the one that Return presses.
+    using Answers = std::vector<std::pair<const wchar_t*, Protection>>;
+    const Answers answers =
+        question.canKeep()
+            ? Answers{{L"Keep", Protection::Kept}, {L"Don't Keep", Protection::Plain}, {L"Cancel", Protection::None}}
+            : Answers{{L"Cancel", Protection::None}, {L"Don't Keep", Protection::Plain}};
+    const juce::Component::SafePointer<MainGui> self(this);
+    const core::DataModel* const model = m_model;
+    const std::int32_t pressed = AlertWindowBase::instance().show(
+        question.text(), answers[0].first, answers[1].first, answers.size() > 2 ? answers[2].first : std::wstring());
+    const bool isSame = self && m_model == model && m_model && isEnabled() && m_controls.isEnabled();
+    if (!isSame || pressed < 1 || pressed > static_cast<std::int32_t>(answers.size()) ||
+        m_engine->canStart() != Result::Ok)
+        return Protection::None;
+    return answers[static_cast<std::size_t>(pressed) - 1].second;
+}
+
+void MainGui::requestRun(Protection protection)
+{
     const bool hadFocus = hasKeyboardFocus(true);
-    const Result::Type answer = m_engine->startCadrel();
+    Result::Type answer = Result::Ok;
+    if (protection == Protection::Kept) {
+        // While the user was asked, the list may have changed.
+        const core::ProtectedRun run = plannedRun();
+        if (!run.needsRun()) {
+            Guard::tell(translated(L"Everything stands where the new cut has it. Nothing has to change."));
+            return;
+        }
+        {
+            const auto command = core::createDataModelCommand(translated(L"Keep Sound outside of the Change EDL"));
+            run.putStartableListInto(*m_model);
+        }
+        answer = m_engine->startCadrelWithin(run.bounds());
+    } else {
+        answer = m_engine->startCadrel();
+    }
     if (answer != Result::Ok) {
         Guard::tell(EngineAnswers::ofRequest(answer, ActionChangeContext::Run));
         return;

@@ -258,9 +258,13 @@ void SettingsDialog::resized()
 
 void SettingsDialog::visibilityChanged()
 {
-    // Text fields tell of a change later, and whoever waits for the sheet to close wants all of it.
     if (!isVisible())
-        guardUser([this] { storeTexts(); });
+        guardUser([this] {
+            // Text fields tell of a change later, and whoever waits for the sheet to close wants all of it.
+            storeTexts();
+            for (const auto& choice : m_choices)
+                choice->box.hidePopup();
+        });
     Sheet::visibilityChanged();
 }
 

@@ -20,7 +20,7 @@ struct EventRow {
     std::uint32_t position; ///< in the list
 };
 
-/// By what a table is sorted. A usual value is the order of the programme.
+/// By what a table is sorted. The default is the order of the programme.
 struct SortKey {
     int column = EventColumn::DstIn;
     /// What a table's header calls so: the values fall down the table.

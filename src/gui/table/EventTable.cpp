@@ -3,6 +3,7 @@
 #include "gui/table/EventTable.h"
 
 #include "gui/guard/Guard.h"
+#include "gui/look/ButtonTile.h"
 #include "gui/table/EventColumn.h"
 #include "gui/table/EventTableModel.h"
 
@@ -15,6 +16,7 @@ namespace {
 constexpr int HeaderHeight = 20;
 /// Narrow enough for all columns beside it in the smallest window.
 constexpr int ScrollBarWidth = 12;
+constexpr float FocusCorner = 2.0F;
 
 #if JUCE_LINUX || JUCE_BSD
 /// The Menu key, XK_Menu of X11. JUCE has no name for it, and doesn't send it as a pressed key. The upper bits are those of
@@ -113,6 +115,24 @@ void EventTable::focusGained(FocusChangeType cause)
     guardSystem([&] {
         juce::TableListBox::focusGained(cause);
         readMenuKey();
+        repaint();
+    });
+}
+
+void EventTable::focusLost(FocusChangeType cause)
+{
+    guardSystem([&] {
+        juce::TableListBox::focusLost(cause);
+        repaint();
+    });
+}
+
+void EventTable::paintOverChildren(juce::Graphics& graphics)
+{
+    guardSystem([&] {
+        juce::TableListBox::paintOverChildren(graphics);
+        if (hasKeyboardFocus(false))
+            drawFocusRing(graphics, getLocalBounds().toFloat(), FocusCorner);
     });
 }
 

@@ -19,6 +19,8 @@ public:
     bool keyPressed(const juce::KeyPress& key) override;
     bool keyStateChanged(bool isKeyDown) override;
     void focusGained(FocusChangeType cause) override;
+    void focusLost(FocusChangeType cause) override;
+    void paintOverChildren(juce::Graphics& graphics) override;
     /// The menu is closed. A key may have gone up while it had the keys.
     void menuClosed();
 

@@ -103,7 +103,7 @@ void EventTimeLineView::highlightEvents(const std::vector<std::shared_ptr<core::
 
 void EventTimeLineView::resized()
 {
-    forgetBlocks();
+    guardSystem([this] { forgetBlocks(); });
 }
 
 void EventTimeLineView::forgetBlocks()

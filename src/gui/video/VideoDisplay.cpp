@@ -34,6 +34,16 @@ juce::Image placeholder()
     return image;
 }
 
+/// How many pixels of the screen make one of the component's.
+double pixelsForEachOf(const juce::Component& component)
+{
+    // JUCE leaves out the scale that all its windows share.
+    const double scale = juce::Component::getApproximateScaleFactorForComponent(&component) *
+                         juce::Desktop::getInstance().getGlobalScaleFactor();
+    const juce::ComponentPeer* const peer = component.getPeer();
+    return peer ? scale * peer->getPlatformScaleFactor() : scale;
+}
+
 /// Half of what is left of the height.
 int halfWithout(int height, int rest)
 {
@@ -179,9 +189,7 @@ void VideoDisplay::updatePictureSize()
 {
     if (!m_provider)
         return;
-    const juce::ComponentPeer* const peer = getPeer();
-    const double scale = getApproximateScaleFactorForComponent(this) * (peer ? peer->getPlatformScaleFactor() : 1.0);
-    const PixelSize size = VideoFrames::pixelsOf(m_oldImage.getWidth(), m_oldImage.getHeight(), scale);
+    const PixelSize size = VideoFrames::pixelsOf(m_oldImage.getWidth(), m_oldImage.getHeight(), pixelsForEachOf(*this));
     m_provider->setImageSize(size.width, size.height);
 }
 

@@ -106,6 +106,8 @@ public:
     /// Those of them that a run could carry over: none that the user has locked, though a run frees what the system itself
     /// holds locked, and none on which runs alone write.
     std::vector<Track> availableTracks();
+    /// What stands on the tracks that a run changes: clips, markers and automation points.
+    std::vector<core::SecondsRange> material();
     /// With it the tracks are gathered once, and only those that the system makes are added. To be on for the time of a run
     /// alone, in which nobody else edits.
     void setUseTrackCache(bool flag);
@@ -153,7 +155,7 @@ public:
     // Work for the engine; in ProjectEdits.cpp.
 
     /// Writes the source of the cut's events to their destination in the preview stretch. What would stand before the time
-    /// origin is left out.
+    /// origin or 00:00:00:00 is left out.
     void processCut(Velmark::IEditTransaction& transaction, core::Cut& cut);
     /// The numbers of the events of which processCut has left out something that is there, since startWriting. What a
     /// restricted run doesn't replace doesn't count.
@@ -193,7 +195,7 @@ public:
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces, in seconds of the project's clock: the range that the user restricts it to, or else the day that
-    /// timecodes can name.
+    /// timecodes can name. What is before that day stays in any case.
     void getApplyRange(double& start, double& end) const;
     /// Lets the host join the pieces that the cuts have left of one clip.
     void closeRange(bool onlySelected, double start, double end);
@@ -285,15 +287,18 @@ private:
     // Edits.
     /// Selected, where the settings ask for selected tracks alone.
     bool isWanted(const Track& track) const;
-    /// The tracks on which a run may write, whose automation it leads over what nothing covers.
-    std::vector<Track> automatedTracks();
+    /// The tracks that a run or preview carries over, and all marker tracks. While one writes, they are those from its begin
+    /// but for what is locked since: on what the user selects or unlocks meanwhile, nothing is written that could replace
+    /// what is there.
+    std::vector<Track> conformedTracks();
+    /// Before which nothing is written, on the project's clock.
+    double earliestPlace() const;
     Velmark::Counted<Velmark::IObjectList> listOf(const std::vector<const Track*>& tracks) const;
     void copyRange(const std::vector<const Track*>& tracks, double start, double end, double destination);
     void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);
     void moveBack(Velmark::IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end);
-    /// Whether something stands on the tracks in the part of a source that would come to stand before the time origin.
-    bool hasBeforeOrigin(const std::vector<const Track*>& tracks, const core::SecondsRange& source,
-                         double destination) const;
+    /// Whether something stands on the tracks in the part of a source that would come to stand before the earliest place.
+    bool isLeftOut(const std::vector<const Track*>& tracks, const core::SecondsRange& source, double destination) const;
     void writeDestinationMarker(Velmark::IEditTransaction& transaction, const core::EventBase& event);
     void tick(std::uint64_t steps);
 
@@ -315,6 +320,7 @@ private:
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;
     std::vector<std::uint32_t> m_leftOutEvents;
+    std::optional<std::vector<Track>> m_tracksOfEdit; ///< from startWriting to rememberWritten
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;
     bool m_useTrackCache = false;

@@ -138,6 +138,28 @@ std::wstring destinationName(const core::EventBase& event, const core::Settings&
 
 } // namespace
 
+std::vector<SecondsRange> Project::material()
+{
+    const double origin = timeOrigin();
+    std::vector<SecondsRange> stretches;
+    for (const Track& track : conformedTracks()) {
+        // Each run marks anew.
+        if (isMarkerTrackOfRuns(track))
+            continue;
+        for (const HostEvent& event : track.clipEvents()) {
+            const SecondsRange span = track.eventSpan(event);
+            stretches.push_back({origin + span.start, origin + span.end});
+        }
+        for (const auto& curve : curvesOf(*track.node())) {
+            for (const auto& point : childrenOf(*curve)) {
+                const double start = origin + point->getStart(nullptr);
+                stretches.push_back({start, start});
+            }
+        }
+    }
+    return stretches;
+}
+
 std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBase>& changeEvent)
 {
     const core::Framerate framerate = getFramerate();
@@ -146,13 +168,10 @@ std::shared_ptr<core::Cut> Project::makeCut(const std::shared_ptr<core::EventBas
     const double dstIn = changeEvent->dstIn().toSeconds(framerate);
     const double dstOut = changeEvent->dstOut().toSeconds(framerate);
 
-    findMarkerTracks();
     core::Cut::CutEvents cutEvents;
-    for (const Track& track : cadrelTracks()) {
-        // The markers of an earlier run aren't carried over: this run writes them anew. completeApply empties the memos'
-        // track, whatever is selected.
-        if (track.hostLocked() || isMarkerTrackOfRuns(track) ||
-            !(isWanted(track) || track == markerTrack(TrackRole::Memos)))
+    for (const Track& track : conformedTracks()) {
+        // The markers of an earlier run aren't carried over: this run writes them anew.
+        if (isMarkerTrackOfRuns(track))
             continue;
         auto cutEvent = std::make_shared<CutEvent>(track, m_indexes);
         cutEvent->setSrcIn(srcIn);
@@ -170,17 +189,17 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
     const core::EventBase& event = *cut.event();
     if (m_progress)
         m_progress->setText(destinationName(event, m_model.settings()));
-    bool isLeftOut = false;
+    bool hasGap = false;
     for (const SourceGroup& group : groupsOf(cut)) {
-        // There is no room before the begin of the host's timeline. What comes along of a clip that hangs over may reach
-        // there, and events may after the time origin has moved.
-        const double missing = std::max(timeOrigin() - group.destination, 0.0);
+        // There is no room before the begin of the host's timeline, nor before that of the preview stretch. What comes along
+        // of a clip that hangs over may reach there, and events may after the time origin has moved.
+        const double missing = std::max(earliestPlace() - group.destination, 0.0);
         const double start = group.source.start + missing;
-        isLeftOut = isLeftOut || hasBeforeOrigin(group.tracks, group.source, group.destination);
+        hasGap = hasGap || isLeftOut(group.tracks, group.source, group.destination);
         if (isBefore(start, group.source.end))
             copyRange(group.tracks, start, group.source.end, group.destination + missing + offset);
     }
-    if (isLeftOut)
+    if (hasGap)
         m_leftOutEvents.push_back(event.eventNumber());
     tick(cut.cutEvents().size());
     const Track& destinations = markerTrack(TrackRole::Destination);
@@ -188,15 +207,13 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
         writeDestinationMarker(transaction, event);
 }
 
-//     time origin                |
+//     earliest place             |
 //     new place             |--------------|
 //     left out              |----|
-bool Project::hasBeforeOrigin(const std::vector<const Track*>& tracks, const SecondsRange& source,
-                              double destination) const
+bool Project::isLeftOut(const std::vector<const Track*>& tracks, const SecondsRange& source, double destination) const
 {
-    const double origin = timeOrigin();
     const double length = source.end - source.start;
-    SecondsRange place{destination, std::min(destination + length, origin)};
+    SecondsRange place{destination, std::min(destination + length, earliestPlace())};
     const core::Settings& settings = m_model.settings();
     if (settings.restrictRange()) {
         place.start = std::max(place.start, settings.preserveMaterialBefore());
@@ -204,7 +221,7 @@ bool Project::hasBeforeOrigin(const std::vector<const Track*>& tracks, const Sec
     }
     if (!isBefore(place.start, place.end))
         return false;
-    const double toHost = source.start - destination - origin;
+    const double toHost = source.start - destination - timeOrigin();
     return std::ranges::any_of(tracks, [&](const Track* track) {
         return !eventsReachingInto(*track, place.start + toHost, place.end + toHost).empty();
     });
@@ -252,7 +269,7 @@ void Project::holdAutomation(IEditTransaction& transaction, const core::CutList&
     const double previewEnd = std::min(end, offset - ClearedMargin);
     // A preview shows what lies beyond the range too.
     end = isPart ? end : offset;
-    for (auto& [node, track] : gapTracksOf(automatedTracks(), cuts)) {
+    for (auto& [node, track] : gapTracksOf(conformedTracks(), cuts)) {
         const std::vector<SecondsRange> gaps =
             isPart || !track.done.isEmpty() ? track.done.uncovered({start, end}) : std::vector<SecondsRange>();
         for (AutomationCurve& curve : track.curves) {
@@ -283,7 +300,7 @@ void Project::markVirginTerritories(IEditTransaction& transaction, const core::C
 {
     const double offset = requiredOffset();
     m_indexes.clear();
-    GapTracks tracks = gapTracksOf(automatedTracks(), cuts);
+    GapTracks tracks = gapTracksOf(conformedTracks(), cuts);
     for (std::size_t i = 1; i < cuts.size(); ++i) {
         tick(tracks.size());
         const core::Cut& before = *cuts.cutAt(i - 1);
@@ -310,14 +327,12 @@ void Project::markVirginTerritories(IEditTransaction& transaction, const core::C
 
 void Project::completeApply(IEditTransaction& transaction)
 {
-    findMarkerTracks();
-    std::vector<Track> tracks = cadrelTracks();
-    std::erase_if(tracks, [this](const Track& track) {
-        return track.hostLocked() || !(isWanted(track) || isMarkerTrack(track));
-    });
+    std::vector<Track> tracks = conformedTracks();
     double start = 0.0;
     double end = 0.0;
     getApplyRange(start, end);
+    // No timecode names a time before, so that nothing could come there in the place of what is there.
+    start = std::max(start, 0.0);
     if (isBefore(start, end))
         moveBack(transaction, tracks, start, end);
     if (m_model.settings().restrictRange()) {
@@ -340,13 +355,14 @@ void Project::moveBack(IEditTransaction& transaction, std::vector<Track>& tracks
     const double carried = std::max(start, origin);
     if (isBefore(carried, end))
         copyRange(pointersTo(tracks), carried + offset, end + offset, carried);
-    // What is before the stretch belongs to the real programme, and an edge there would leave automation points in it.
-    const double written = std::max(start, 0.0);
-    if (!isBefore(written, end))
-        return;
     for (const Track& track : tracks)
-        removePoints(transaction, track, {written + offset - origin, end + offset - origin});
-    deleteRange(transaction, written + offset, end + offset);
+        removePoints(transaction, track, {start + offset - origin, end + offset - origin});
+    deleteRange(transaction, start + offset, end + offset);
+}
+
+double Project::earliestPlace() const
+{
+    return std::max(timeOrigin(), 0.0);
 }
 
 void Project::getApplyRange(double& start, double& end) const
@@ -405,10 +421,13 @@ bool Project::isWanted(const Track& track) const
     return m_model.settings().applyTo() != ApplyTo::SelectedTracks || track.isSelected();
 }
 
-std::vector<Track> Project::automatedTracks()
+std::vector<Track> Project::conformedTracks()
 {
-    std::vector<Track> tracks = cadrelTracks();
-    std::erase_if(tracks, [this](const Track& track) { return track.hostLocked() || !isWanted(track); });
+    findMarkerTracks();
+    std::vector<Track> tracks = m_tracksOfEdit ? *m_tracksOfEdit : cadrelTracks();
+    std::erase_if(tracks, [this](const Track& track) {
+        return track.hostLocked() || !(m_tracksOfEdit || isWanted(track) || isMarkerTrack(track));
+    });
     return tracks;
 }
 

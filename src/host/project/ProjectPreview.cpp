@@ -101,10 +101,13 @@ void Project::startWriting()
     ensurePreviewOffset();
     m_writingFrom = requiredOffset() - timeOrigin();
     m_leftOutEvents.clear();
+    m_tracksOfEdit.reset();
+    m_tracksOfEdit = conformedTracks();
 }
 
 void Project::rememberWritten()
 {
+    m_tracksOfEdit.reset();
     const std::optional<double> start = std::exchange(m_writingFrom, std::nullopt);
     if (!start)
         return;

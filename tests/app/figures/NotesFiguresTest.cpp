@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/Film.h"
+#include "tests/app/NotesOfCuts.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/figures/EdlFrames.h"
 #include "tests/app/figures/NotesReplay.h"
@@ -9,6 +10,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <functional>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <regex>
@@ -101,11 +103,7 @@ std::string outputOf(const char* command, const Recut& recut, const char* output
     arguments.insert(arguments.end(), {output, folder / file});
     const Outcome outcome = runCadrel(arguments);
     EXPECT_EQ(outcome.status, 0) << outcome.err;
-    if (!file.ends_with(".pdf"))
-        return contentOf(folder / file);
-    const Outcome text = runProgram("pdftotext", {"-layout", folder / file, "-"});
-    EXPECT_EQ(text.status, 0) << text.err;
-    return text.out;
+    return file.ends_with(".pdf") ? textOfPdf(folder / file) : contentOf(folder / file);
 }
 
 json notesOf(const Recut& recut, const std::vector<std::string>& more = {})
@@ -606,58 +604,108 @@ std::vector<std::string> sortedNumbers(const std::string& text)
     return numbers;
 }
 
-TEST_F(NotesFigures, EveryWordAndNumberThatIsPrintedIsThatOfAChange)
+/// A form of the notes, by the extension of its file; the JSON is that of the same run.
+using FormOf = std::function<std::string(const std::string& extension)>;
+
+/// Looks at all that the notes of two cuts print in each form but the table.
+void expectPrinted(const FormOf& formOf, const EdlFrames& oldCut, const EdlFrames& newCut)
 {
     using Form = PrintedNotes::Form;
     const std::string order = "The steps are carried out";
     const std::string start = "The largest changes";
+    const json notes = json::parse(formOf(".json"));
+    ASSERT_EQ(NotesReplay(notes, oldCut, newCut).faults(), std::vector<std::string>());
+    // What is doubted in broken cuts has tests of its own.
+    for (const char* const side : {"old", "new"})
+        ASSERT_TRUE(notes.at(side).at("doubts").empty() && notes.at(side).at("unread").empty() &&
+                    notes.at(side).at("overlappingFiles").empty());
+    const PrintedNotes printed(notes);
+    const std::string text = joinedWords(formOf(".txt"));
+    const std::string html = formOf(".html");
+    const std::string page = wordsOfPage(html);
+    const std::string paper = wordsOfPaper(formOf(".pdf"), printed);
+
+    EXPECT_EQ(partingOf(from(text, start), printed.body(Form::Text)), "");
+    EXPECT_EQ(partingOf(from(page, start), printed.body(Form::Page)), "");
+    EXPECT_EQ(partingOf(from(paper, start), printed.body(Form::Paper)), "");
+
+    const std::string simplified = "--simplify " + std::to_string(notes.at("simplifyFrames").get<int>()) + " ";
+    EXPECT_EQ(partingOf(between(text, "Old cut", " Settings "), printed.headBeforeSettings(Form::Text)), "");
+    EXPECT_EQ(partingOf(between(text, "Length ", " " + order), printed.headAfterSettings(Form::Text)), "");
+    EXPECT_EQ(partingOf(between(page, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Page)), "");
+    EXPECT_EQ(partingOf(between(paper, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Paper)), "");
+    EXPECT_NE(between(text, " Settings ", "Length ").find(simplified), std::string::npos);
+    EXPECT_NE(between(page, " Settings:", order).find(simplified), std::string::npos);
+    EXPECT_NE(between(paper, " Settings:", order).find(simplified), std::string::npos);
+
+    const std::string strips = stripsOfPage(notes, oldCut, newCut);
+    EXPECT_NE(between(page, order, start).find(strips), std::string::npos) << between(page, order, start);
+    EXPECT_EQ(sortedNumbers(between(page, order, start)), sortedNumbers(strips));
+    std::vector<std::string> numbers = reelNumbers(notes, "old");
+    const std::vector<std::string> newNumbers = reelNumbers(notes, "new");
+    numbers.insert(numbers.end(), newNumbers.begin(), newNumbers.end());
+    std::sort(numbers.begin(), numbers.end());
+    EXPECT_EQ(sortedNumbers(between(paper, order, start)), numbers);
+
+    const std::regex title("data-rows=\"s([0-9]+)[^>]*><title>([^<]*)</title>");
+    std::size_t titles = 0;
+    for (std::sregex_iterator match(html.begin(), html.end(), title), end; match != end; ++match, ++titles)
+        EXPECT_EQ((*match)[2], printed.action(std::stoi((*match)[1])));
+    EXPECT_EQ(matchesIn(html, std::regex("<title>")).size(), titles + 1);
+    EXPECT_GT(titles, 0U);
+}
+
+TEST_F(NotesFigures, EveryWordAndNumberThatIsPrintedIsThatOfAChange)
+{
     std::vector<Recut> recuts = all();
     recuts.push_back(nudged(cuts));
     recuts.back().options.insert(recuts.back().options.end(), {"--simplify", "100"});
     for (const Recut& recut : recuts) {
-        const std::vector<std::string> more{"--feet"};
-        const EdlFrames oldCut(recut.oldFiles, recut.rules);
-        const EdlFrames newCut(recut.newFiles, recut.rules);
-        const json notes = notesOf(recut, more);
-        ASSERT_EQ(NotesReplay(notes, oldCut, newCut).faults(), std::vector<std::string>());
-        // What is doubted in broken cuts has tests of its own.
-        for (const char* const side : {"old", "new"})
-            ASSERT_TRUE(notes.at(side).at("doubts").empty() && notes.at(side).at("unread").empty());
-        const PrintedNotes printed(notes);
-        const std::string text = joinedWords(outputOf("notes", recut, "-o", "notes.txt", more));
-        const std::string html = outputOf("notes", recut, "-o", "notes.html", more);
-        const std::string page = wordsOfPage(html);
-        const std::string paper = wordsOfPaper(outputOf("notes", recut, "-o", "notes.pdf", more), printed);
-
-        EXPECT_EQ(partingOf(from(text, start), printed.body(Form::Text)), "");
-        EXPECT_EQ(partingOf(from(page, start), printed.body(Form::Page)), "");
-        EXPECT_EQ(partingOf(from(paper, start), printed.body(Form::Paper)), "");
-
-        const std::string simplified = "--simplify " + std::to_string(notes.at("simplifyFrames").get<int>()) + " ";
-        EXPECT_EQ(partingOf(between(text, "Old cut", " Settings "), printed.headBeforeSettings(Form::Text)), "");
-        EXPECT_EQ(partingOf(between(text, "Length ", " " + order), printed.headAfterSettings(Form::Text)), "");
-        EXPECT_EQ(partingOf(between(page, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Page)), "");
-        EXPECT_EQ(partingOf(between(paper, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Paper)), "");
-        EXPECT_NE(between(text, " Settings ", "Length ").find(simplified), std::string::npos);
-        EXPECT_NE(between(page, " Settings:", order).find(simplified), std::string::npos);
-        EXPECT_NE(between(paper, " Settings:", order).find(simplified), std::string::npos);
-
-        const std::string strips = stripsOfPage(notes, oldCut, newCut);
-        EXPECT_NE(between(page, order, start).find(strips), std::string::npos) << between(page, order, start);
-        EXPECT_EQ(sortedNumbers(between(page, order, start)), sortedNumbers(strips));
-        std::vector<std::string> numbers = reelNumbers(notes, "old");
-        const std::vector<std::string> newNumbers = reelNumbers(notes, "new");
-        numbers.insert(numbers.end(), newNumbers.begin(), newNumbers.end());
-        std::sort(numbers.begin(), numbers.end());
-        EXPECT_EQ(sortedNumbers(between(paper, order, start)), numbers);
-
-        const std::regex title("data-rows=\"s([0-9]+)[^>]*><title>([^<]*)</title>");
-        std::size_t titles = 0;
-        for (std::sregex_iterator match(html.begin(), html.end(), title), end; match != end; ++match, ++titles)
-            EXPECT_EQ((*match)[2], printed.action(std::stoi((*match)[1])));
-        EXPECT_EQ(matchesIn(html, std::regex("<title>")).size(), titles + 1);
-        EXPECT_GT(titles, 0U);
+        const auto formOf = [&recut](const std::string& extension) {
+            return outputOf("notes", recut, "-o", "notes" + extension, {"--feet"});
+        };
+        expectPrinted(formOf, EdlFrames(recut.oldFiles, recut.rules), EdlFrames(recut.newFiles, recut.rules));
     }
+}
+
+/// The notes of a run that carries the sound of the example over.
+std::string soundNotes(const std::string& extension, const std::vector<std::string>& more)
+{
+    const TempFolder folder;
+    const std::string file = folder / ("notes" + extension);
+    const Recut recut = example();
+    std::vector<std::string> arguments{"apply",    treePath("examples/reel3/reel3.stage"),
+                                       "--old",    recut.oldFiles.front(),
+                                       "--new",    recut.newFiles.front(),
+                                       "--notes",  file,
+                                       "--summary"};
+    arguments.insert(arguments.end(), recut.options.begin(), recut.options.end());
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    const Outcome outcome = runCadrel(arguments);
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    return extension == ".pdf" ? textOfPdf(file) : contentOf(file);
+}
+
+TEST_F(NotesFigures, EveryWordAndNumberOfTheSoundIsThatOfAChange)
+{
+    const Recut recut = example();
+    // With "cut", the leader falls out where no picture changes.
+    for (const std::vector<std::string>& more :
+         std::vector<std::vector<std::string>>{{}, {"--feet"}, {"--keep", "cut"}, {"--heal", "none"}}) {
+        const auto formOf = [&more](const std::string& extension) { return soundNotes(extension, more); };
+        expectPrinted(formOf, EdlFrames(recut.oldFiles, recut.rules), EdlFrames(recut.newFiles, recut.rules));
+    }
+}
+
+TEST_F(NotesFigures, WholeRowsOfTheSoundInTheCsvAreThoseOfTheChanges)
+{
+    const std::vector<std::string> expected = PrintedNotes(json::parse(soundNotes(".json", {}))).table();
+
+    const std::vector<std::string> rows = linesOf(soundNotes(".csv", {}));
+
+    ASSERT_EQ(rows.size(), expected.size() + 1);
+    for (std::size_t row = 0; row < expected.size(); ++row)
+        EXPECT_EQ(rows[row + 1], expected[row] + "\r");
 }
 
 TEST_F(NotesFigures, WholeRowsOfTheCsvAreThoseOfTheChanges)

@@ -120,6 +120,76 @@ std::string inQuotes(const std::string& cell)
     return text + "\"";
 }
 
+/// Of seconds, to a hundredth of a frame.
+std::string exactTimecode(double seconds)
+{
+    const long hundredths = std::lround(seconds * FramesASecond * 100);
+    const std::string rest = std::to_string(100 + hundredths % 100).substr(1);
+    return timecodeOfFrames(static_cast<int>(hundredths / 100)) + (rest == "00" ? "" : "." + rest);
+}
+
+double lengthOf(const json& range)
+{
+    return range.at("out").at("seconds").get<double>() - range.at("in").at("seconds").get<double>();
+}
+
+/// "a, b, c, d and 2 more".
+std::string firstFour(std::vector<std::string> names, std::size_t columns)
+{
+    const std::size_t more = names.size() - std::min<std::size_t>(4, names.size());
+    names.resize(names.size() - more);
+    std::string text;
+    for (const std::string& name : names)
+        text += (text.empty() ? "" : ", ") + cutTo(name, columns);
+    return text + (more == 0 ? "" : " and " + std::to_string(more) + " more");
+}
+
+/// Those numbers that aren't 0, each with its word.
+std::string numbersText(std::initializer_list<std::pair<std::size_t, std::string>> numbers)
+{
+    std::string text;
+    for (const auto& [number, word] : numbers) {
+        if (number > 0)
+            text += (text.empty() ? "" : ", ") + std::to_string(number) + " " + word;
+    }
+    return text;
+}
+
+std::size_t countOf(const json& sound, std::initializer_list<const char*> kinds)
+{
+    std::size_t count = 0;
+    for (const json& change : sound.at("changes"))
+        count += std::find(kinds.begin(), kinds.end(), change.at("kind").get<std::string>()) != kinds.end() ? 1 : 0;
+    return count;
+}
+
+std::string fatesOf(const json& count)
+{
+    const auto number = [&count](const char* key) { return count.at(key).get<std::size_t>(); };
+    const std::string text = numbersText({{number("stay"), "stay"},
+                                          {number("moved"), "moved"},
+                                          {number("trimmed"), "trimmed"},
+                                          {number("split"), "split"},
+                                          {number("doubled"), "doubled"},
+                                          {number("inNoCut"), "in no cut"},
+                                          {number("new"), "new"}});
+    return text.empty() ? "" : ": " + text;
+}
+
+/// The time of day, in whole seconds, from which the project counts: the timecode says it to a frame.
+double originOf(const json& placed)
+{
+    const json& place = placed.contains("was") ? placed.at("was") : placed.contains("now") ? placed.at("now") : placed;
+    const json& start = place.at("in");
+    return std::round(framesOfTimecode(start.at("timecode")) / double{FramesASecond} -
+                      start.at("seconds").get<double>());
+}
+
+bool isEmpty(const json& sound)
+{
+    return sound.at("changes").empty() && sound.at("automationJumps").empty() && sound.at("movedClips") == 0;
+}
+
 } // namespace
 
 PrintedNotes::PrintedNotes(const json& notes) : m_notes(notes)
@@ -186,10 +256,28 @@ std::string PrintedNotes::headBeforeSettings(Form form) const
                      time("movedFrames"),
                      "moved",
                      time("doubledFrames"),
-                     "doubled"});
-    return line({"Old cut:", oldCut, "New cut:", newCut, rate + ",", time("framesBefore"), "before,",
-                 time("framesAfter"), "after,", change + ",", counted(steps, "step"), time("liftedFrames"), "lifted,",
-                 time("insertedFrames"), "inserted,", time("movedFrames"), "moved,", time("doubledFrames"), "doubled"});
+                     "doubled",
+                     soundTotals(form)});
+    return line({"Old cut:",
+                 oldCut,
+                 "New cut:",
+                 newCut,
+                 rate + ",",
+                 time("framesBefore"),
+                 "before,",
+                 time("framesAfter"),
+                 "after,",
+                 change + ",",
+                 counted(steps, "step"),
+                 time("liftedFrames"),
+                 "lifted,",
+                 time("insertedFrames"),
+                 "inserted,",
+                 time("movedFrames"),
+                 "moved,",
+                 time("doubledFrames"),
+                 "doubled",
+                 soundTotals(form)});
 }
 
 std::string PrintedNotes::headAfterSettings(Form form) const
@@ -217,7 +305,8 @@ std::string PrintedNotes::headAfterSettings(Form form) const
                  "Steps",
                  std::to_string(totals.at("steps").get<int>()),
                  "in",
-                 counted(m_notes.at("reels").size(), "reel")});
+                 counted(m_notes.at("reels").size(), "reel"),
+                 soundTotals(form)});
 }
 
 std::string PrintedNotes::materialOf(const json& change) const
@@ -357,7 +446,8 @@ std::string PrintedNotes::rowOf(const json& row, std::size_t reel, int offset, F
         below = line({below, changeOf(change, form)});
     if (row.at("joinedSteps") > 1)
         below = line({below, "joined from", std::to_string(row.at("joinedSteps").get<int>()), "trims that cancel out"});
-    below = line({below, feetOf(row)});
+    below = line({below, row.at("at").contains("feet") ? feetOf(row) : "",
+                  row.contains("sound") ? soundOf(row.at("sound"), form) : ""});
     const int changed = row.at("lengthChangeFrames");
     const std::string lengths = line({changed == 0 ? "" : signedTimecode(changed), lengthChange(offset)});
     const std::string number = std::to_string(row.at("number").get<int>());
@@ -380,7 +470,10 @@ std::string PrintedNotes::largest(Form form) const
 {
     std::string text = "The largest changes";
     for (const int number : m_notes.at("largest")) {
-        const std::string shots = shotsOf(stepOf(number));
+        const json& step = stepOf(number);
+        std::string shots = shotsOf(step);
+        if (step.contains("sound") && !isEmpty(step.at("sound")))
+            shots += " sound: " + soundSummary(step.at("sound"), false);
         text = form == Form::Text ? line({text, std::to_string(number), action(number), shots})
                                   : line({text, "step", std::to_string(number) + ":", action(number) + ",", shots});
     }
@@ -462,6 +555,128 @@ std::string PrintedNotes::remarks() const
     return text.empty() ? "" : "Healed, doubted and passed over " + text;
 }
 
+std::string PrintedNotes::trackName(int number) const
+{
+    return m_notes.at("sound").at("tracks")[static_cast<std::size_t>(number - 1)].at("name");
+}
+
+std::string PrintedNotes::soundTotals(Form form) const
+{
+    if (!m_notes.contains("sound"))
+        return {};
+    const json& sound = m_notes.at("sound");
+    const json& clips = sound.at("clips");
+    const json& markers = sound.at("markers");
+    const std::string first =
+        sound.at("project").get<std::string>() + ", " + counted(clips.at("all"), "clip") + fatesOf(clips);
+    const std::string second = counted(markers.at("all"), "own marker") +
+                               (sound.at("sceneTrack").is_null() ? "" : " besides the scenes") + fatesOf(markers);
+    // The paper says on each line what it is about.
+    return form == Form::Paper ? "Sound: " + first + " Sound: " + second
+                               : (form == Form::Text ? "Sound " : "Sound: ") + first + " " + second;
+}
+
+std::string PrintedNotes::soundSummary(const json& sound, bool namesTracks) const
+{
+    std::vector<std::string> tracks;
+    for (const int track : sound.at("tracks"))
+        tracks.push_back(trackName(track));
+    const std::size_t jumps = sound.at("automationJumps").size();
+    std::string text = numbersText({{countOf(sound, {"head-trimmed", "tail-trimmed"}), "trimmed"},
+                                    {countOf(sound, {"split"}), "split"},
+                                    {countOf(sound, {"doubled"}), "doubled"},
+                                    {countOf(sound, {"fell-out"}), "fell out"},
+                                    {countOf(sound, {"added"}), "new"},
+                                    {sound.at("movedClips").get<std::size_t>(), "moved along"}});
+    if (!tracks.empty())
+        text += ", on " + (namesTracks ? firstFour(tracks, 24) : counted(tracks.size(), "track"));
+    if (jumps > 0)
+        text += (text.empty() ? "" : "; ") + counted(jumps, "automation jump");
+    return text;
+}
+
+std::vector<PrintedNotes::SoundLine> PrintedNotes::soundLines(const json& sound) const
+{
+    std::vector<SoundLine> lines;
+    for (const json& change : sound.at("changes")) {
+        const std::string kind = change.at("kind");
+        const double lost = change.contains("lost") ? lengthOf(change.at("lost")) : 0.0;
+        const std::string frames = exactTimecode(lost);
+        const bool hasLost = lost > 1e-5;
+        const auto start = [&change](const char* when) {
+            return exactTimecode(change.at(when).at("in").at("seconds").get<double>() + originOf(change));
+        };
+        std::string what = "new";
+        if (kind == "head-trimmed" || kind == "tail-trimmed")
+            what = kind.substr(0, 4) + " -" + frames;
+        else if (kind == "split")
+            what = hasLost ? "split, -" + frames : "split";
+        else if (kind == "doubled")
+            what = "once more at " + start("now");
+        else if (kind == "fell-out")
+            what = hasLost ? "fell out, " + frames : "fell out";
+        const std::string part = change.contains("part") ? " (in " + cutTo(change.at("part"), 40) + ")" : std::string();
+        const std::string name = change.at("name");
+        lines.push_back(
+            {what, start(kind == "added" ? "now" : "was"),
+             cutTo(change.at("trackName"), 24) + ": " + (name.empty() ? "(no name)" : cutTo(name, 40)) + part});
+    }
+    for (const json& jump : sound.at("automationJumps")) {
+        std::string tracks;
+        for (const std::string track : jump.at("tracks"))
+            tracks += (tracks.empty() ? "" : ", ") + track;
+        lines.push_back({"automation jumps", exactTimecode(jump.at("in").at("seconds").get<double>() + originOf(jump)),
+                         cutTo(tracks, 80)});
+    }
+    return lines;
+}
+
+std::string PrintedNotes::soundOf(const json& sound, Form form) const
+{
+    constexpr std::size_t MostLines = 30;
+    std::string text;
+    if (!sound.at("scenes").empty())
+        text = "scene: " + firstFour(sound.at("scenes"), 40);
+    if (isEmpty(sound))
+        return text;
+    text = line({text, form == Form::Page ? "sound" : "sound:", soundSummary(sound, true)});
+    const std::vector<SoundLine> lines = soundLines(sound);
+    for (std::size_t index = 0; index < std::min(lines.size(), MostLines); ++index) {
+        const auto& [what, time, name] = lines[index];
+        if (form == Form::Text) {
+            // The columns before the name: 8 blanks, 21 and a blank, 14 and a blank.
+            const std::size_t before = 8 + std::max<std::size_t>(21, what.size()) + 1 + 14 + 1;
+            text = line({text, what, time, cutTo(name, 80 - before)});
+        } else if (form == Form::Page) {
+            text = line({text, time, name, what});
+        } else {
+            text = line({text, time, name + ": " + what});
+        }
+    }
+    if (lines.size() > MostLines)
+        text = line({text, "and", std::to_string(lines.size() - MostLines), "more, which the JSON lists"});
+    return text;
+}
+
+std::string PrintedNotes::soundCells(const json& sound) const
+{
+    std::string tracks;
+    for (const int track : sound.at("tracks"))
+        tracks += (tracks.empty() ? "" : ", ") + trackName(track);
+    std::string lines;
+    for (const SoundLine& line : soundLines(sound))
+        lines += (lines.empty() ? "" : "; ") + line.name + " at " + line.time + ": " + line.what;
+    const auto number = [](std::size_t count) { return std::to_string(count); };
+    std::string row;
+    for (const std::string& cell :
+         {firstFour(sound.at("scenes"), 40), number(countOf(sound, {"head-trimmed", "tail-trimmed"})),
+          number(countOf(sound, {"split"})), number(countOf(sound, {"doubled"})), number(countOf(sound, {"fell-out"})),
+          number(countOf(sound, {"added"})), number(sound.at("movedClips")), tracks,
+          number(sound.at("automationJumps").size()), lines})
+        row += "," + inQuotes(cell);
+    return row;
+}
+
 std::string PrintedNotes::body(Form form) const
 {
     std::string text = line({largest(form), reelList(form)});
@@ -473,7 +688,12 @@ std::string PrintedNotes::body(Form form) const
             text = line({text, rowOf(row, reel, offset, form)});
         }
     }
-    return line({text, remarks()});
+    const bool hasElsewhere = m_notes.contains("sound") && !isEmpty(m_notes.at("sound").at("elsewhere"));
+    return line({text,
+                 hasElsewhere
+                     ? "Sound that changed where no picture did " + soundOf(m_notes.at("sound").at("elsewhere"), form)
+                     : "",
+                 remarks()});
 }
 
 std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
@@ -521,7 +741,7 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
     std::string row;
     for (const std::string& cell : cells)
         row += (row.empty() ? "" : ",") + inQuotes(cell);
-    return row;
+    return row + (step.contains("sound") ? soundCells(step.at("sound")) : "");
 }
 
 std::vector<std::string> PrintedNotes::table() const

@@ -11,7 +11,7 @@
 namespace cadrel::tests {
 
 /// All that the forms of notes have to print, word by word and number by number, told from their JSON alone. Words have one blank
-/// between them.
+/// between them. Names are of one byte a letter.
 class PrintedNotes {
 public:
     enum class Form { Text, Page, Paper };
@@ -37,6 +37,12 @@ private:
         std::string more;
     };
 
+    struct SoundLine {
+        std::string what;
+        std::string time;
+        std::string name;
+    };
+
     Words wordsOf(const nlohmann::json& change) const;
     std::string materialOf(const nlohmann::json& change) const;
     std::string actionOf(const nlohmann::json& row, std::size_t reel) const;
@@ -48,6 +54,12 @@ private:
     std::string reelList(Form form) const;
     std::string reelHeading(std::size_t reel, Form form) const;
     std::string remarks() const;
+    std::string soundOf(const nlohmann::json& sound, Form form) const;
+    std::string soundSummary(const nlohmann::json& sound, bool namesTracks) const;
+    std::string soundTotals(Form form) const;
+    std::string soundCells(const nlohmann::json& sound) const;
+    std::string trackName(int number) const;
+    std::vector<SoundLine> soundLines(const nlohmann::json& sound) const;
     std::string cutName(const char* side) const;
     std::string cutLine(const char* side) const;
     std::string tableRow(const nlohmann::json& step, std::size_t reel) const;

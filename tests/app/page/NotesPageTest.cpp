@@ -280,7 +280,7 @@ TEST_F(NotesPage, AMoveBetweenReelsIsToldInBothOfThem)
     show(pageOf(twoReels(false), twoReels(true)));
 
     EXPECT_EQ(browser.valueOf("document.getElementById('m2-1').innerText.replace(/\\s+/g, ' ').trim()"),
-              "02:00:20:00 moved 00:00:10:00 from reel 1, step 1 step 1: MOVED +00:00:10:00");
+              "02:00:20:00 moved 00:00:10:00 from reel 1, step 1 MOVED +00:00:10:00");
     EXPECT_EQ(browser.valueOf("marksFor('m2-1').every(mark => mark.dataset.rows === 's1 m2-1 k2-2')"), true);
     for (const std::string id : {"s1", "m2-1", "k2-2", "k1-1", "k2-1"}) {
         EXPECT_TRUE(clickOn(id)) << id;
@@ -327,6 +327,30 @@ TEST_F(NotesPage, AMarkOfOneFrameInALongFilmIsAPixelWide)
         EXPECT_EQ(browser.valueOf("getComputedStyle(" + self + ").stroke"),
                   browser.valueOf("getComputedStyle(" + self + ").fill"));
     }
+}
+
+TEST_F(NotesPage, ABandThatGoesFarIsAPixelWideInItsMiddle)
+{
+    // The weir stands once more near the end of the reel. Its band is four pixels wide at its ends, and much less between.
+    EXPECT_GE(count("all('path.doubled').length"), 1);
+    EXPECT_EQ(browser.valueOf("all('path.doubled, path.moved').filter(band => getComputedStyle(band).stroke !== "
+                              "getComputedStyle(band).fill || getComputedStyle(band).strokeWidth !== '1px' || "
+                              "getComputedStyle(band).vectorEffect !== 'non-scaling-stroke').length"),
+              0);
+    // A point on each of 50 upright lines between both ends.
+    EXPECT_EQ(browser.valueOf(R"((() => {
+        const band = document.querySelector('path.doubled'), box = band.getBoundingClientRect();
+        let missed = 0;
+        for (let line = 1; line < 50; ++line) {
+            const x = box.left + box.width * line / 50;
+            let meets = false;
+            for (let y = box.top; y <= box.bottom; y += 0.25)
+                meets ||= document.elementsFromPoint(x, y).includes(band);
+            missed += meets ? 0 : 1;
+        }
+        return missed;
+    })())"),
+              0);
 }
 
 TEST_F(NotesPage, TheBoxesHaveTheHuesOfThePicture)

@@ -2,6 +2,7 @@
 
 #include "gui/look/LookAndFeel.h"
 #include "gui/look/Text.h"
+#include "gui/table/EventColumn.h"
 #include "tests/support/window/WindowOnScreen.h"
 
 #include <gtest/gtest.h>
@@ -114,6 +115,24 @@ TEST_F(LookAndFeelDrawingTest, ShadesAButtonThatIsOnInItsOnColour)
     expectShade(drawnButton(button, true), {163, 204, 255}, {116, 146, 182});
     button.setColour(juce::TextButton::buttonOnColourId, juce::Colour(255, 173, 0));
     expectShade(drawnButton(button, false), {255, 173, 0}, {182, 124, 0});
+}
+
+TEST_F(LookAndFeelDrawingTest, MarksAButtonThatIsOnWithADarkBarBesideItsColour)
+{
+    juce::TextButton button;
+    button.setClickingTogglesState(true);
+    const juce::Image off = drawnButton(button, false);
+    button.setToggleState(true, juce::dontSendNotification);
+    const juce::Image on = drawnButton(button, false);
+
+    for (const int y : {16, 17}) {
+        EXPECT_EQ(on.getPixelAt(20, y), juce::Colours::black);
+        EXPECT_GT(off.getPixelAt(20, y).getBrightness(), 0.4F);
+    }
+    EXPECT_GT(on.getPixelAt(20, 15).getBrightness(), 0.4F);
+    EXPECT_GT(on.getPixelAt(20, 18).getBrightness(), 0.4F);
+    button.setEnabled(false);
+    EXPECT_LT(drawnButton(button, false).getPixelAt(20, 16).getBrightness(), off.getPixelAt(20, 16).getBrightness());
 }
 
 TEST_F(LookAndFeelDrawingTest, ShadesAPressedToggleInItsOnColour)
@@ -406,6 +425,25 @@ TEST_F(LookAndFeelDrawingTest, EndsTheNameOfATableColumnBeforeItsArrow)
         EXPECT_LE(columnsThatDiffer(withName(name), withName({})).getEnd(), arrow.getStart()) << name;
     }
     EXPECT_GT(columnsThatDiffer(withName("HHHHHHHHHHHHHHHHHHHH"), withName({})).getEnd(), 50);
+}
+
+TEST_F(LookAndFeelDrawingTest, HasRoomForTheNameOfEachSortedColumnAtItsLeastWidth)
+{
+    juce::TableHeaderComponent header;
+    const auto drawnIn = [&](int width, const juce::String& name) {
+        return drawn(300, 20, [&](juce::Graphics& graphics) {
+            m_look.drawTableHeaderColumn(graphics, header, name, 1, width, 20, false, false,
+                                         juce::TableHeaderComponent::sortedForwards);
+        });
+    };
+    const auto expectRoom = [&](const juce::String& name, int width) {
+        const juce::Range<int> whole = columnsThatDiffer(drawnIn(300, name), drawnIn(300, {}));
+        EXPECT_EQ(columnsThatDiffer(drawnIn(width, name), drawnIn(width, {})), whole) << name;
+    };
+
+    for (const EventColumn& column : EventColumn::all())
+        expectRoom(juce::String(EventColumn::name(column.id).c_str()), column.width);
+    expectRoom("Bl.", EventColumn::all()[EventColumn::Transition - 1].width);
 }
 
 TEST_F(LookAndFeelDrawingTest, PointsUpWhereValuesRiseDownTheTable)

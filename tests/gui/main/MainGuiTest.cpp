@@ -131,6 +131,7 @@ TEST_F(MainGuiTest, HasItsControlsInTheirOrder)
                                             "newEdlSelectedEventsValue",
                                             "changeEdlSelectedEventsLabel",
                                             "changeEdlSelectedEventsValue",
+                                            "videodisplay",
                                             "Source Toggle",
                                             "Destination Toggle",
                                             "m_showNewVideosDialogButton",
@@ -139,8 +140,7 @@ TEST_F(MainGuiTest, HasItsControlsInTheirOrder)
                                             "new component"};
     std::vector<std::string> names;
     for (const juce::Component* const control : controls().getChildren()) {
-        if (control->getName() != "videodisplay")
-            names.push_back(control->getName().toStdString());
+        names.push_back(control->getName().toStdString());
     }
     EXPECT_EQ(names, expected);
 }
@@ -266,6 +266,23 @@ TEST_F(MainGuiTest, EmptiesItselfWhenTheProjectGoes)
     EXPECT_EQ(table("New").getModel(), nullptr);
     // The selection that is stored isn't lost with it.
     EXPECT_EQ(property(PropertyKey::ChangeTableSelection), "1");
+}
+
+TEST_F(MainGuiTest, EmptiesItselfAlsoWhenTheFrameRateHasGoneWithTheProject)
+{
+    showThree();
+    select("Change", {1});
+    {
+        const NoProject noProject;
+        deactivate();
+
+        EXPECT_EQ(m_gui->model(), nullptr);
+        EXPECT_EQ(counters("change"), "0 0 0");
+        EXPECT_FALSE(video().isActive());
+        EXPECT_FALSE(m_gui->isEnabled());
+    }
+    activate();
+    EXPECT_EQ(counters("change"), "3 1 0");
 }
 
 TEST_F(MainGuiTest, ShowsAnotherModelInTablesOfItsOwn)
@@ -930,6 +947,153 @@ TEST_F(MainGuiTest, TellsOnceThatAPreviewIsIncomplete)
               Texts{L"The preview isn't complete.\nThe workstation has refused this. Check that no track is locked."});
 }
 
+// ---- Video ---------------------------------------------------------------------------------------------------------
+
+const std::string NoTimes = "--:--:--:-- - --:--:--:--";
+
+TEST_F(MainGuiTest, ShowsTheFramesOfTheOneSelectedEvent)
+{
+    showThree();
+    EXPECT_FALSE(video().isActive());
+    EXPECT_EQ(times(), NoTimes);
+    select("Change", {1});
+    EXPECT_TRUE(video().isActive());
+    EXPECT_EQ(times(), "01:00:05:00 - 02:00:05:00");
+    EXPECT_FALSE(m_video->request(gui::VideoProviderBase::OldSide).lastFrame);
+
+    click("m_videoRightToggle");
+    EXPECT_EQ(times(), "01:00:10:00 - 02:00:10:00");
+    EXPECT_TRUE(m_video->request(gui::VideoProviderBase::NewSide).lastFrame);
+    click("m_videoLeftToggle");
+    EXPECT_EQ(times(), "01:00:05:00 - 02:00:05:00");
+}
+
+TEST_F(MainGuiTest, ShowsNoFramesOfSeveralEvents)
+{
+    showThree();
+    select("Change", {0, 1});
+    EXPECT_FALSE(video().isActive());
+    select("Change", {0});
+    EXPECT_TRUE(video().isActive());
+    table("Change").deselectAllRows();
+    EXPECT_FALSE(video().isActive());
+}
+
+TEST_F(MainGuiTest, ShowsNoFramesOfAnEventWithoutUsableTimes)
+{
+    list(ListKind::Change).add(makeEvent("A001", "01:00:00:00", "01:00:05:00", "02:00:00:00", "02:99:05:00"));
+    activate();
+    select("Change", {0});
+
+    EXPECT_FALSE(video().isActive());
+    EXPECT_EQ(times(), NoTimes);
+}
+
+TEST_F(MainGuiTest, ShowsNoFramesWhenTheProjectGoesOrTheEvent)
+{
+    showThree();
+    select("Change", {1});
+    list(ListKind::Change).erase(1, 1);
+    EXPECT_FALSE(video().isActive());
+    select("Change", {0});
+    deactivate();
+    EXPECT_FALSE(video().isActive());
+}
+
+TEST_F(MainGuiTest, DropsWhatKeepsAPictureFromComing)
+{
+    showThree();
+    m_video->failure = Result::HostCallFailed;
+    select("Change", {1});
+
+    EXPECT_EQ(property(PropertyKey::ChangeTableSelection), "1");
+    EXPECT_EQ(m_alerts.messages, Texts());
+}
+
+TEST_F(MainGuiTest, AsksForFramesOnceWhenInOrOutIsPressed)
+{
+    showThree();
+    select("Change", {1});
+    const int before = m_video->requestCount;
+    click("m_videoRightToggle");
+
+    EXPECT_EQ(m_video->requestCount, before + 2);
+}
+
+TEST_F(MainGuiTest, OpensTheChoiceOfVideos)
+{
+    activate();
+    EXPECT_TRUE(videosDialog().isEnabled());
+    click("m_showNewVideosDialogButton");
+    EXPECT_TRUE(videosDialog().isVisible());
+    EXPECT_FALSE(controls().isEnabled());
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_FALSE(videosDialog().isVisible());
+    EXPECT_TRUE(controls().isEnabled());
+}
+
+TEST_F(MainGuiTest, ClosesTheChoiceOfVideosWhenTheProjectGoes)
+{
+    activate();
+    click("m_showNewVideosDialogButton");
+    m_model.videoList().add({"/a.mov", core::Timecode("01:00:00:00"), core::Timecode("00:00:01:00")}, false);
+    EXPECT_TRUE(videosDialog().isVisible());
+    deactivate();
+
+    EXPECT_FALSE(videosDialog().isVisible());
+    EXPECT_EQ(m_alerts.messages, Texts());
+}
+
+// ---- Settings ------------------------------------------------------------------------------------------------------
+
+TEST_F(MainGuiTest, OpensTheSettings)
+{
+    activate();
+    EXPECT_TRUE(settingsDialog().isEnabled());
+    click("Settings Button");
+    EXPECT_TRUE(settingsDialog().isVisible());
+    EXPECT_FALSE(controls().isEnabled());
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_FALSE(settingsDialog().isVisible());
+    EXPECT_TRUE(controls().isEnabled());
+}
+
+TEST_F(MainGuiTest, MarksVfxShotsAtOnceWhenTheSettingsClose)
+{
+    fill(ListKind::Old, 1);
+    activate();
+    click("Settings Button");
+    m_model.settings().setVfxPattern({"A00", "", true}, 0);
+    EXPECT_FALSE(list(ListKind::Old).at(0).vfx());
+    m_window.press(juce::KeyPress::escapeKey);
+
+    EXPECT_TRUE(list(ListKind::Old).at(0).vfx());
+}
+
+TEST_F(MainGuiTest, ShowsSettingsThatChangeElsewhere)
+{
+    activate();
+    click("Settings Button");
+    auto& renaming = find<juce::ToggleButton>(settingsDialog(), "B Roll Renaming");
+    const bool before = renaming.getToggleState();
+    m_model.settings().setBRollRenaming(!before);
+
+    EXPECT_EQ(renaming.getToggleState(), !before);
+}
+
+TEST_F(MainGuiTest, ClosesTheSettingsWhenAnotherProjectComes)
+{
+    activate();
+    click("Settings Button");
+    DataModel other;
+    notify(core::DataModelChangeContext(&other));
+    EXPECT_FALSE(settingsDialog().isVisible());
+    EXPECT_TRUE(settingsDialog().isEnabled());
+    deactivate();
+
+    EXPECT_FALSE(settingsDialog().isEnabled());
+}
+
 // ---- The run -------------------------------------------------------------------------------------------------------
 
 TEST_F(MainGuiTest, StartsARunAndIsDisabledUntilItsEnd)
@@ -1014,6 +1178,107 @@ TEST_F(MainGuiTest, TellsThatARunIsIncompleteAndWhy)
               Texts{L"The run has ended before it was complete. Undo takes back what it has done.\nThe workstation has "
                     L"refused this. Check that no track is locked."});
     EXPECT_TRUE(m_gui->isEnabled());
+}
+
+// ---- What a run would take away ------------------------------------------------------------------------------------
+
+class MainGuiProtectionTest : public ShownWindow {
+protected:
+    /// Fifteen seconds from 01:00:00:00 come to stand ten seconds later, and a minute of sound stands at 05:00:00:00.
+    void showGivenList()
+    {
+        list(ListKind::Change).add(makeEvent("A001", "01:00:00:00", "01:00:15:00", "01:00:10:00", "01:00:25:00", 1));
+        m_engine.material = {{3600, 3615}, {5 * 3600, 5 * 3600 + 60}};
+        activate();
+    }
+};
+
+TEST_F(MainGuiProtectionTest, StartsARunThatTakesNothingAwayWithoutAQuestion)
+{
+    showGivenList();
+    m_engine.material.pop_back();
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+}
+
+TEST_F(MainGuiProtectionTest, KeepsWhatTheListDoesNotCarryUnlessTheUserWantsOtherwise)
+{
+    showGivenList();
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_alerts.messages[0].substr(0, 11), L"00:01:00:00");
+    EXPECT_EQ(m_alerts.buttons[0], (Texts{L"Keep", L"Don't Keep", L"Cancel"}));
+    EXPECT_EQ(m_engine.calls, Calls{"run 3600..3625"});
+    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
+    EXPECT_FALSE(m_gui->isEnabled());
+}
+
+TEST_F(MainGuiProtectionTest, TakesItAwayWhenTheUserWantsThat)
+{
+    showGivenList();
+    m_alerts.answer = 2;
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+    EXPECT_EQ(m_undo.begun, Texts());
+}
+
+TEST_F(MainGuiProtectionTest, StartsNoRunWhenTheUserCancelsOrClosesTheQuestion)
+{
+    showGivenList();
+    for (const std::int32_t answer : {3, 0, 4}) {
+        m_alerts.answer = answer;
+        click("Cadrel Button");
+    }
+
+    EXPECT_EQ(m_engine.calls, Calls());
+    EXPECT_EQ(m_undo.begun, Texts());
+    EXPECT_TRUE(m_gui->isEnabled());
+}
+
+TEST_F(MainGuiProtectionTest, StartsNoRunWhenTheProjectGoesDuringTheQuestion)
+{
+    showGivenList();
+    m_alerts.meanwhile = [this] { deactivate(); };
+    click("Cadrel Button");
+    activate();
+    m_alerts.meanwhile = [this] { m_engine.ready = Result::NoTracks; };
+    click("Cadrel Button");
+    m_alerts.meanwhile = [this] { m_gui.reset(); };
+    m_engine.ready = Result::Ok;
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiProtectionTest, StartsNoRunWhenItCannotLookAtTheProject)
+{
+    showGivenList();
+    m_engine.material = {{10, 5}};
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_engine.calls, Calls());
+    EXPECT_EQ(m_alerts.messages, Texts{L"This could not be carried out."});
+}
+
+TEST_F(MainGuiProtectionTest, TellsThatNothingHasToChange)
+{
+    for (const int kind : {0, 1, 2})
+        fill(kind, 1);
+    // The cut onto itself.
+    list(ListKind::New).clear();
+    list(ListKind::New).append(list(ListKind::Old));
+    list(ListKind::Change).clear();
+    list(ListKind::Change).add(makeEvent("A001", "01:00:00:00", "01:00:05:00", "01:00:00:00", "01:00:05:00", 1));
+    m_engine.material = {{3500, 3510}};
+    activate();
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_alerts.messages.back(), L"Everything stands where the new cut has it. Nothing has to change.");
+    EXPECT_EQ(m_engine.calls, Calls());
 }
 
 // ---- Editing, keys -------------------------------------------------------------------------------------------------

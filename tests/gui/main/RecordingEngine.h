@@ -6,6 +6,7 @@
 #include "core/edl/EventList.h"
 #include "core/model/DataModel.h"
 #include "tests/support/core/MemoryEngine.h"
+#include "tests/support/core/TestPool.h"
 #include "util/Result.h"
 
 #include <cstdint>
@@ -25,10 +26,21 @@ public:
     util::Result::Type answer = util::Result::Ok;
     util::Result::Type thrown = util::Result::Ok; ///< thrown by what is asked for, when it isn't Ok
     std::vector<std::string> calls;
+    TestPool pool;
+    std::vector<core::SecondsRange> material;
     std::function<void()> onPreview; ///< called once, when the preview is switched
 
     util::Result::Type canStart() override { return ready; }
     util::Result::Type startCadrel() override { return note("run"); }
+    /// "run 3600..3610", in whole seconds.
+    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds) override
+    {
+        return note(std::string("run ")
+                        .append(std::to_string(static_cast<long>(bounds.start)))
+                        .append("..")
+                        .append(std::to_string(static_cast<long>(bounds.end))));
+    }
+    std::vector<core::SecondsRange> getMaterial() override { return material; }
     /// "preview 1+2+3 1 1 0": the numbers of the events, the neighbours on both sides and the options.
     util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                     std::uint32_t options) override
@@ -42,6 +54,7 @@ public:
     }
     util::Result::Type endPreview() override { return note("end"); }
     std::wstring getProjectName() override { return L"/films/film.stage"; }
+    core::MediaPoolInterface* getMediaPool() override { return &pool; }
     void setPreviewActive(bool active) override
     {
         note(active ? "on" : "off");

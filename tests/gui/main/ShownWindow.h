@@ -15,6 +15,7 @@
 #include "tests/support/window/FocusedWindow.h"
 #include "tests/support/window/RecordingAlerts.h"
 #include "tests/support/window/RecordingFileBox.h"
+#include "tests/support/window/TestVideo.h"
 
 #include <gtest/gtest.h>
 
@@ -50,6 +51,7 @@ protected:
         m_model.setNotifier(&m_notifier);
         m_gui->setEngine(&m_engine);
         m_gui->setNotifier(&m_notifier);
+        m_gui->setVideoSource(m_video);
         m_window.addAndMakeVisible(*m_gui);
     }
     ~ShownWindow() override
@@ -125,13 +127,25 @@ protected:
             .toStdString();
     }
     gui::FileDialog& fileDialog() const { return find<gui::FileDialog>(*m_gui, "m_fileDialog"); }
-    gui::TcEditDialog& editDialog() const
+    gui::TcEditDialog& editDialog() const { return sheet<gui::TcEditDialog>(); }
+    gui::NewVideosDialog& videosDialog() const { return sheet<gui::NewVideosDialog>(); }
+    gui::SettingsDialog& settingsDialog() const { return sheet<gui::SettingsDialog>(); }
+    template <class Dialog>
+    Dialog& sheet() const
     {
         for (juce::Component* const child : m_gui->getChildren()) {
-            if (auto* const dialog = dynamic_cast<gui::TcEditDialog*>(child))
+            if (auto* const dialog = dynamic_cast<Dialog*>(child))
                 return *dialog;
         }
-        throw std::runtime_error("there is no edit dialog");
+        throw std::runtime_error("there is no such sheet");
+    }
+    gui::VideoDisplay& video() const { return find<gui::VideoDisplay>(controls(), "videodisplay"); }
+    /// What the video preview says: "old time - new time".
+    std::string times() const
+    {
+        return (find<juce::Label>(video(), "old time").getText() + " - " +
+                find<juce::Label>(video(), "new time").getText())
+            .toStdString();
     }
     void click(const std::string& name) { m_window.click(button(name)); }
     void select(const std::string& name, const std::vector<int>& rows)
@@ -160,6 +174,7 @@ protected:
     CountingNotifier m_notifier;
     core::DataModel m_model;
     RecordingEngine m_engine{m_model};
+    std::shared_ptr<TestVideo> m_video = std::make_shared<TestVideo>();
     FocusedWindow m_window{gui::MainGui::Width, gui::MainGui::Height};
     std::unique_ptr<gui::MainGui> m_gui = std::make_unique<gui::MainGui>();
 };

@@ -98,13 +98,14 @@ TEST_F(EventTableModelTest, PutsTheLargestValueAtTheTopAtTheFirstClickOnAHeader)
     select({1});
     auto& header = m_table.getHeader();
 
-    header.setSortColumnId(EventColumn::Roll, true);
+    header.columnClicked(EventColumn::Roll, {});
     pumpMessages();
     EXPECT_TRUE(model.getSortForwards());
     EXPECT_EQ(selectedRows(), (Rows{0}));
 
-    header.setSortColumnId(EventColumn::Roll, false);
+    header.columnClicked(EventColumn::Roll, {});
     pumpMessages();
+    EXPECT_FALSE(model.getSortForwards());
     EXPECT_EQ(selectedRows(), (Rows{1}));
     EXPECT_EQ(model.getSelectedEvents(), (Events{b}));
 }
@@ -611,7 +612,7 @@ TEST_F(EventTableModelTest, TakesTheAnswerForTheSameEventsInAnotherOrder)
     model.applySort(EventColumn::DstIn, true);
     m_choose(EventMenu::Delete);
     EXPECT_EQ(list().events(), (Events{events[2], events[3], events[4]}));
-    // What followed the event that was clicked has moved up: nothing, so the row before.
+    // No event came after the clicked one in the new order, so the last row is selected.
     EXPECT_EQ(model.getSelectedEvents(), (Events{events[2]}));
 }
 

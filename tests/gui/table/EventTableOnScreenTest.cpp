@@ -75,6 +75,22 @@ bool isMenuKeyDown()
 
 } // namespace
 
+TEST_F(EventTableOnScreenTest, ShowsThatItHasTheKeyboard)
+{
+    const auto edge = [&] {
+        return m_table.createComponentSnapshot(m_table.getLocalBounds(), true, 1.0F).getPixelAt(300, 0);
+    };
+    ASSERT_TRUE(m_table.hasKeyboardFocus(false));
+    const juce::Colour focused = edge();
+
+    m_table.giveAwayKeyboardFocus();
+    window().serve();
+    EXPECT_NE(edge(), focused);
+    m_table.grabKeyboardFocus();
+    window().serve();
+    EXPECT_EQ(edge(), focused);
+}
+
 TEST_F(EventTableOnScreenTest, DeletesByTheMenuOfARightClick)
 {
     click(1, ModifierKeys::rightButtonModifier);

@@ -9,6 +9,9 @@
 
 #include <gtest/gtest.h>
 
+#include <utility>
+#include <vector>
+
 using cadrel::core::EventFlaw;
 using cadrel::gui::EventColumn;
 using cadrel::tests::pumpMessages;
@@ -37,7 +40,7 @@ using Rows = std::vector<int>;
 
 } // namespace
 
-TEST_F(EventTableTest, HasTheColumnsWithTheirWidths)
+TEST_F(EventTableTest, HasTheTenColumns)
 {
     const juce::TableHeaderComponent& header = m_table.getHeader();
     EXPECT_EQ(m_table.getName(), "Change Table List Box");
@@ -48,6 +51,38 @@ TEST_F(EventTableTest, HasTheColumnsWithTheirWidths)
         EXPECT_EQ(header.getColumnIdOfIndex(index, true), index + 1);
     EXPECT_EQ(header.getColumnName(EventColumn::ClipName), "Clip Name");
     EXPECT_FALSE(m_table.isAutoSizeMenuOptionShown());
+}
+
+TEST_F(EventTableTest, LetsNobodyResizeOrMoveAColumn)
+{
+    juce::TableHeaderComponent& header = m_table.getHeader();
+    const auto dragFrom = [&](int x, int by) {
+        const auto at = [&](int where, bool isDragged) {
+            return juce::MouseEvent(juce::Desktop::getInstance().getMainMouseSource(),
+                                    {static_cast<float>(where), 10.0F}, ModifierKeys::leftButtonModifier,
+                                    juce::MouseInputSource::defaultPressure, 0.0F, 0.0F, 0.0F, 0.0F, &header, &header,
+                                    {}, {static_cast<float>(x), 10.0F}, {}, 1, isDragged);
+        };
+        header.mouseMove(at(x, false));
+        header.mouseDown(at(x, false));
+        header.mouseDrag(at(x + by, true));
+        header.mouseUp(at(x + by, true));
+    };
+    const auto layout = [&] {
+        std::vector<std::pair<int, int>> columns;
+        for (int index = 0; index < header.getNumColumns(true); ++index) {
+            const int id = header.getColumnIdOfIndex(index, true);
+            columns.emplace_back(id, header.getColumnWidth(id));
+        }
+        return columns;
+    };
+    m_table.setSize(1056, 200);
+    const auto before = layout();
+
+    const juce::Rectangle<int> names = header.getColumnPosition(4);
+    dragFrom(names.getRight() - 1, 20);
+    dragFrom(names.getCentreX(), 200);
+    EXPECT_EQ(layout(), before);
 }
 
 TEST_F(EventTableTest, StretchesItsNamesAndNothingElse)
@@ -199,13 +234,11 @@ TEST_F(EventTableTest, GivesTheTextsOfTheColumnsThatAreShown)
     show();
     m_table.getHeader().setColumnVisible(EventColumn::Number, false);
     pumpMessages();
-    m_table.updateContent();
     EXPECT_EQ(titleOf(0, EventColumn::Number), "none");
     EXPECT_EQ(titleOf(0, EventColumn::Roll), "A001");
     EXPECT_EQ(titleOf(0, EventColumn::DstOut), "01:00:05:00");
     m_table.getHeader().setColumnVisible(EventColumn::Number, true);
     pumpMessages();
-    m_table.updateContent();
     EXPECT_EQ(titleOf(0, EventColumn::Number), "1");
     EXPECT_EQ(titleOf(0, EventColumn::Roll), "A001");
 }

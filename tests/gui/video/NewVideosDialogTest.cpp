@@ -552,6 +552,19 @@ TEST_F(NewVideosDialogTest, TakesTheStartThatIsTyped)
     EXPECT_FALSE(isOpen());
 }
 
+TEST_F(NewVideosDialogTest, TakesNoStartThatTheRateDoesNotHave)
+{
+    open();
+    m_window.click(use(0));
+    start(0).grabKeyboardFocus();
+
+    m_window.type("01000025");
+    EXPECT_EQ(m_list.at(0).start, Timecode("01:00:00:00"));
+
+    m_window.type("24");
+    EXPECT_EQ(m_list.at(0).start, Timecode("01:00:00:24"));
+}
+
 TEST_F(NewVideosDialogTest, TakesTheStartThatWasTypedWhenItIsClosedByAClickOutside)
 {
     open();

@@ -6,6 +6,7 @@
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/TestProject.h"
 #include "tests/support/window/CutTexts.h"
+#include "tests/support/window/FocusedWindow.h"
 #include "tests/support/window/GermanTexts.h"
 #include "tests/support/window/Pictures.h"
 #include "tests/support/window/RecordingAlerts.h"
@@ -252,6 +253,22 @@ TEST_F(VideoDisplayTest, AsksForThePixelsOfTheScreen)
     m_display->setSize(204, 349);
     EXPECT_EQ(m_video->request(Old).width, 376);
     EXPECT_EQ(m_video->request(Old).height, 154);
+}
+
+TEST_F(VideoDisplayTest, AsksForThePixelsOfAScreenThatEnlargesAllWindows)
+{
+    juce::Desktop::getInstance().setGlobalScaleFactor(1.5F);
+    {
+        m_display->setProvider(m_video);
+        FocusedWindow window(400, 400);
+
+        window.addAndMakeVisible(*m_display);
+
+        EXPECT_EQ(m_video->request(Old).width, 426);
+        EXPECT_EQ(m_video->request(Old).height, 57);
+        window.removeChildComponent(m_display.get());
+    }
+    juce::Desktop::getInstance().setGlobalScaleFactor(1.0F);
 }
 
 TEST_F(VideoDisplayTest, AsksForNothingNewWhileItsImagesHaveTheSameSize)

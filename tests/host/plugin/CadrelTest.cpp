@@ -3,14 +3,10 @@
 #include "host/plugin/Cadrel.h"
 
 #include "gui/main/MainGui.h"
-#include "gui/picture/VideoProviderBase.h"
-#include "host/Host.h"
-#include "host/video/ProjectVideo.h"
 #include "standin/Application.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/module/ModuleLoader.h"
 #include "standin/project/Project.h"
-#include "standin/services/IdleManager.h"
 #include "standin/services/MenuRegistry.h"
 #include "standin/services/Translations.h"
 #include "standin/services/WindowFactoryRegistry.h"
@@ -20,6 +16,7 @@
 #include "velmark/ModuleState.h"
 #include "velmark/Project.h"
 
+#include "tests/host/plugin/WatchedPictures.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/ThisProcess.h"
 #include "tests/support/TreePaths.h"
@@ -42,11 +39,13 @@ using cadrel::gui::VideoProviderBase;
 using cadrel::host::Cadrel;
 using cadrel::host::tests::AlteredContext;
 using cadrel::tests::isMapped;
+using cadrel::tests::PictureWatch;
 using cadrel::tests::ProcessResources;
 
 namespace {
 
-constexpr unsigned long Background = 0x2b2c2d;
+/// Of the band of the change EDL.
+constexpr unsigned long Band = 0x565d63;
 
 class OtherHostInfo : public Implements<OtherHostInfo, FObject, IHostInfo> {
 public:
@@ -138,28 +137,6 @@ public:
     bool throws = false;
     bool throwsAtOpen = false;
     bool failsAfterTheView = false;
-};
-
-/// What a window asks for pictures.
-std::shared_ptr<VideoProviderBase> picturesOf(standin::Application& application)
-{
-    for (IIdleHandler* const handler : application.idleManager().handlers()) {
-        if (auto* const host = dynamic_cast<cadrel::host::Host*>(handler))
-            return std::dynamic_pointer_cast<VideoProviderBase>(host->getVideoProvider());
-    }
-    return nullptr;
-}
-
-/// Looks at the pictures while it lives.
-class PictureWatch : public VideoProviderBase::Listener {
-public:
-    explicit PictureWatch(VideoProviderBase& pictures) : m_pictures(pictures) { m_pictures.addListener(this); }
-    ~PictureWatch() override { m_pictures.removeListener(this); }
-
-    void imageChanged(std::size_t) override {}
-
-private:
-    VideoProviderBase& m_pictures;
 };
 
 class CadrelTest : public testing::Test, protected cadrel::tests::HostLoop {
@@ -456,7 +433,7 @@ TEST_F(CadrelTest, TakesItsRegistrationsBackOnceTheLastOneFirst)
 TEST_F(CadrelTest, DrawsNoPicturesAfterItsEndWhenProjectsChange)
 {
     m_cadrel->initialize(m_application.context());
-    const auto pictures = picturesOf(m_application);
+    const auto pictures = cadrel::tests::picturesOf(m_application);
     ASSERT_NE(pictures, nullptr);
     const auto isDrawn = [&](std::size_t side) { return pictures->getImage(side).getPixelAt(0, 0).isOpaque(); };
     {
@@ -509,7 +486,7 @@ TEST_F(CadrelTest, IsUnmappedAsAModuleOfAHostWithAJuceOfItsOwn)
         const standin::ModuleLoader loader(m_application, module, m_bundle);
         ASSERT_TRUE(isMapped("Cadrel.so"));
         ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
-        ASSERT_TRUE(turnUntil([this] { return m_windows.colourAt(400, 400) == Background; }));
+        ASSERT_TRUE(turnUntil([this] { return m_windows.colourAt(400, 400) == Band; }));
     };
     // What the first round opens for good, fonts for one, is the system's.
     loadAndUnload();

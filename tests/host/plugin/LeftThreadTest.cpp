@@ -1,13 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "gui/picture/VideoProviderBase.h"
-#include "host/Host.h"
-#include "host/video/ProjectVideo.h"
 #include "standin/module/ModuleLoader.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/MediaClip.h"
-#include "standin/services/IdleManager.h"
 
+#include "tests/host/plugin/WatchedPictures.h"
 #include "tests/support/ThisProcess.h"
 #include "tests/support/TreePaths.h"
 #include "tests/support/standin/TestHost.h"
@@ -31,7 +28,6 @@
 #include <unistd.h>
 
 using namespace Velmark;
-using cadrel::gui::VideoProviderBase;
 using cadrel::tests::isMapped;
 
 namespace fs = std::filesystem;
@@ -65,22 +61,6 @@ std::set<pid_t> threads()
     return ids;
 }
 
-/// What a window asks for pictures, of the module that works on the host.
-std::shared_ptr<VideoProviderBase> picturesOf(standin::Application& application)
-{
-    for (IIdleHandler* const handler : application.idleManager().handlers()) {
-        if (auto* const host = dynamic_cast<cadrel::host::Host*>(handler))
-            return std::dynamic_pointer_cast<VideoProviderBase>(host->getVideoProvider());
-    }
-    return nullptr;
-}
-
-/// Looks at the pictures, so that they are drawn.
-class Watch : public VideoProviderBase::Listener {
-public:
-    void imageChanged(std::size_t) override {}
-};
-
 /// Ends the process: 0 when the module has stayed for a thread that had to be left, and that thread has come to its end.
 [[noreturn]] void leaveAThreadAlone()
 {
@@ -92,15 +72,15 @@ public:
         Counted<standin::MediaClip>::share(&host.addVideo(u"/video/reel.mov", 10.0)));
     auto loader = std::make_unique<standin::ModuleLoader>(
         host.application, cadrel::tests::programPath("../lib/Cadrel.so"), cadrel::tests::treePath("resources"));
-    auto pictures = picturesOf(host.application);
+    auto pictures = cadrel::tests::picturesOf(host.application);
     if (!pictures)
         _exit(2);
     const std::set<pid_t> before = threads();
-    Watch window;
-    pictures->addListener(&window);
-    pictures->setImageSize(16, 9);
-    host.application.idle();
-    pictures->removeListener(&window);
+    {
+        const cadrel::tests::PictureWatch window(*pictures);
+        pictures->setImageSize(16, 9);
+        host.application.idle();
+    }
     pictures.reset();
     // The old picture alone is there, and has a thread of its own.
     const std::set<pid_t> after = threads();

@@ -6,6 +6,7 @@
 #include "core/cut/ProgressHandlerBase.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
+#include "core/protect/RestrictedRange.h"
 #include "core/settings/Settings.h"
 #include "util/StringUtil.h"
 
@@ -110,6 +111,9 @@ Result::Type MemoryEngine::carryOutRun()
     const core::EventList& changeList = m_model.changeEdl();
     const ShownProgress shown(m_progress, m_shownProgress, L"Processing Project",
                               estimateSteps(changeList.size(), m_model.settings(), candidates().size()), true);
+    std::optional<core::RestrictedRange> restricted;
+    if (m_runBounds)
+        restricted.emplace(m_model.settings(), *m_runBounds);
     const Result::Type result = run(changeList);
     if (result == Result::Cancelled)
         removeVirginTerritoryMarkers();
@@ -131,9 +135,29 @@ Result::Type MemoryEngine::carryOutPreview(const PreviewRequest& request)
 Result::Type MemoryEngine::startCadrel()
 {
     const Result::Type result = canStart();
-    if (result == Result::Ok)
+    if (result == Result::Ok) {
         m_isRunRequested = true;
+        m_runBounds.reset();
+    }
     return result;
+}
+
+Result::Type MemoryEngine::startCadrelWithin(const core::SecondsRange& bounds)
+{
+    const Result::Type result = startCadrel();
+    if (result == Result::Ok)
+        m_runBounds = bounds;
+    return result;
+}
+
+std::vector<core::SecondsRange> MemoryEngine::getMaterial()
+{
+    std::vector<core::SecondsRange> material;
+    for (const MemoryTrack* const track : candidates()) {
+        for (const MemoryClip& clip : track->clips())
+            material.push_back({clip.start, clip.end});
+    }
+    return material;
 }
 
 Result::Type MemoryEngine::startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,

@@ -62,6 +62,8 @@ public:
     util::Result::Type onIdle();
 
     util::Result::Type startCadrel() override;
+    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds) override;
+    std::vector<core::SecondsRange> getMaterial() override;
     util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                     std::uint32_t options) override;
     /// Sets both cycles to the span of the events without the neighbours, and the position to its start.
@@ -121,6 +123,7 @@ private:
     std::vector<core::MarkerEntry> m_stretchMarkers;
     std::optional<double> m_stretchStart;
     bool m_isRunRequested = false;
+    std::optional<core::SecondsRange> m_runBounds;
     std::optional<PreviewRequest> m_requestedPreview;
     core::EventList m_projectEvents;
     Transport m_transport;

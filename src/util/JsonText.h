@@ -5,10 +5,10 @@
 #include <string>
 #include <string_view>
 
-namespace standin {
+namespace cadrel::util {
 
 /// Texts and numbers as they stand in JSON. A number has as few digits as lead back to it.
 void appendJsonText(std::string& json, std::string_view text);
 void appendJsonNumber(std::string& json, double number);
 
-} // namespace standin
+} // namespace cadrel::util

@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/JsonText.h"
+#include "util/JsonText.h"
 
 #include <array>
 #include <charconv>
 #include <cmath>
 
-namespace standin {
+namespace cadrel::util {
 
 void appendJsonText(std::string& json, std::string_view text)
 {
@@ -38,4 +38,4 @@ void appendJsonNumber(std::string& json, double number)
     json.append(digits.data(), written.ptr);
 }
 
-} // namespace standin
+} // namespace cadrel::util
