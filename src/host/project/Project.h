@@ -10,6 +10,7 @@
 #include "core/time/FramerateProvider.h"
 #include "host/project/MediaPool.h"
 #include "host/project/MemoSync.h"
+#include "host/project/PreviewRecord.h"
 #include "host/project/ProjectEnd.h"
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
@@ -190,8 +191,8 @@ public:
     void rememberWritten();
     /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
     /// since stays, and so does what he has moved, renamed, slipped or given another length, clip or content; a copy that he
-    /// has changed in no other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
-    /// written.
+    /// has changed in no other way than by its gain or the like goes. Automation in the stretch goes from the start of what
+    /// was written on its track.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces, in seconds of the project's clock: the range that the user restricts it to, or else the day that
@@ -244,6 +245,8 @@ private:
     bool isPreviewing() const;
     /// With the rate and the time origin of when it was written.
     MemoSync::Previewed previewed();
+    /// What is kept of the preview that stands there: by the memos' track or, where it keeps nothing, by the first that does.
+    std::optional<PreviewRecord::Head> writtenHead();
     /// Of the last event of any track, from the time origin.
     double contentEnd();
     /// Of the last automation point.
