@@ -12,6 +12,7 @@
 #include "host/project/MemoSync.h"
 #include "host/project/PreviewRecord.h"
 #include "host/project/ProjectEnd.h"
+#include "host/track/EventReach.h"
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
 #include "host/track/TrackIndexes.h"
@@ -27,6 +28,7 @@
 #include <array>
 #include <cstdint>
 #include <limits>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -301,7 +303,7 @@ private:
     void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);
     void moveBack(Velmark::IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end);
     /// Whether something stands on the tracks in the part of a source that would come to stand before the earliest place.
-    bool isLeftOut(const std::vector<const Track*>& tracks, const core::SecondsRange& source, double destination) const;
+    bool isLeftOut(const std::vector<const Track*>& tracks, const core::SecondsRange& source, double destination);
     void writeDestinationMarker(Velmark::IEditTransaction& transaction, const core::EventBase& event);
     void tick(std::uint64_t steps);
 
@@ -323,6 +325,8 @@ private:
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;
     std::vector<std::uint32_t> m_leftOutEvents;
+    /// Of each track that was asked, since startWriting. What the cuts read doesn't change until completeApply.
+    std::map<const Velmark::ITrackNode*, EventReach> m_sources;
     std::optional<std::vector<Track>> m_tracksOfEdit; ///< from startWriting to rememberWritten
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;

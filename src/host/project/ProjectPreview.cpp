@@ -90,6 +90,7 @@ void Project::startWriting()
     ensurePreviewOffset();
     m_writingFrom = requiredOffset() - timeOrigin();
     m_leftOutEvents.clear();
+    m_sources.clear();
     m_tracksOfEdit.reset();
     m_tracksOfEdit = conformedTracks();
 }
