@@ -139,7 +139,8 @@ struct AttributeKey {
     static constexpr const char* FolderType = "Cadrel:FolderType";
     /// On a marker: an integer by which the marker is known in the source and in the preview stretch.
     static constexpr const char* EventUserId = "CadrEventUserId";
-    /// On a copy of a memo in the preview stretch: a number made of what it was like when its memo followed it last.
+    /// On a copy of a memo in the preview stretch: a number made of what it was like when it was written or its memo followed
+    /// it last.
     static constexpr const char* Followed = "Cadrel:Followed";
     /// On a marker: the reel of the change event, a text.
     static constexpr const char* Reel = "User:STR_MAReel";

@@ -55,6 +55,7 @@ MainGui::~MainGui()
         m_notifier->removeListener(this);
     m_settingsDialog.removeComponentListener(this);
     m_fileDialog.removeComponentListener(this);
+    closeSheets();
     guardSystem([this] { letGoOfModel(); });
 }
 

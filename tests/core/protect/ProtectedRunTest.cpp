@@ -123,8 +123,10 @@ TEST_F(ProtectedRunTest, HasAnEventToStartWithWhereAReelOnlyGoes)
     EXPECT_TRUE(m_model.changeEdl().isEmpty());
     run.putStartableListInto(m_model);
 
-    ASSERT_EQ(m_model.changeEdl().size(), 1U);
-    EXPECT_EQ(m_model.changeEdl().at(0).dstOut().toString(), "01:00:10:00");
+    // The pop stays, and so does the reel after it.
+    ASSERT_EQ(m_model.changeEdl().size(), 2U);
+    EXPECT_EQ(m_model.changeEdl().at(0).dstOut().toString(), "00:59:59:00");
+    EXPECT_EQ(m_model.changeEdl().at(1).dstOut().toString(), "01:00:10:00");
 }
 
 TEST_F(ProtectedRunTest, LeavesAGivenListAsItIs)

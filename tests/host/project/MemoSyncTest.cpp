@@ -24,7 +24,6 @@
 #include <functional>
 #include <map>
 #include <numeric>
-#include <set>
 #include <sstream>
 #include <string>
 #include <tuple>
@@ -1355,125 +1354,6 @@ RC_GTEST_PROP(MemoSyncLaw, AMemoFollowsItsCopyAndNoOtherChanges, ())
             RC_ASSERT(preview.found() == before);
         }
     }
-}
-
-/// A user who writes, pastes, moves, renames and removes memos of a film and of its preview. Now and then nobody follows.
-class BusyUser : public PreviewedMemos {
-public:
-    explicit BusyUser(Chance& chance) : PreviewedMemos(chance.oneIn(2) ? 0.0 : 3600.0), m_chance(chance)
-    {
-        for (int count = 0; count < 6; ++count)
-            write(0.0, 70.0);
-        // The last one covers the middle of the first.
-        preview({tenSeconds(), event("01:00:50:00", "01:01:00:00", "01:00:40:00", "01:00:50:00"),
-                 event("01:00:25:00", "01:00:27:00", "01:00:34:00", "01:00:36:00")});
-        m_following = hook->whenCalled;
-    }
-
-    void editSomething()
-    {
-        const auto before = m_names;
-        const std::size_t entries = host.project.undoList().doneCount();
-        const bool isFollowed = !m_chance.oneIn(3);
-        hook->whenCalled = isFollowed ? m_following : [](const std::string&) {};
-        edit();
-        RC_LOG() << (isFollowed ? "followed: " : "not followed: ") << testing::PrintToString(film()) << " "
-                 << testing::PrintToString(copies()) << "\n";
-        if (m_chance.oneIn(5) && host.project.undoList().doneCount() > entries) {
-            host.undo();
-            m_names = before;
-            RC_LOG() << "undone\n";
-        }
-    }
-    void endPreview()
-    {
-        host.adapter.model().setPreviewActive(false);
-        host.edit(u"End", [&] { host.adapter.clearPreview(*host.transaction()); });
-    }
-    void requireAll()
-    {
-        std::set<std::u16string> found;
-        for (const auto& memo : childrenOf(*memos))
-            found.insert(memo->getName());
-        for (const std::u16string& name : m_names)
-            RC_ASSERT(found.contains(name));
-    }
-
-private:
-    static constexpr double PreviewStart = Day + 28.0;
-    static constexpr double PreviewEnd = Day + 52.0;
-
-    void edit()
-    {
-        std::vector<TrackHost::Node> all = childrenOf(*memos);
-        if (all.empty())
-            return;
-        const TrackHost::Node memo = m_chance.oneOf(all);
-        std::erase_if(all, [&](const auto& each) { return each->getStart(nullptr) < PreviewedMemos::film(Day); });
-        const auto copy = all.empty() ? nullptr : m_chance.oneOf(all);
-        switch (copy ? m_chance.below(6) : m_chance.below(3)) {
-        case 0:
-            write(0.0, 70.0);
-            break;
-        case 1:
-            write(PreviewStart, PreviewEnd);
-            break;
-        case 2:
-            host.edit(u"Paste", [&] {
-                const std::int64_t id = idOf(memo);
-                const auto pasted = m_chance.oneIn(2) ? write(0.0, 70.0) : write(PreviewStart, PreviewEnd);
-                if (id >= 0)
-                    HostEvent(host.handle(memos), pasted).setUserId(id);
-            });
-            break;
-        case 3:
-            move(copy, time(PreviewStart, PreviewEnd) - Day);
-            break;
-        case 4:
-            m_names.erase(copy->getName());
-            rename(copy, newName().c_str());
-            break;
-        default:
-            m_names.erase(copy->getName());
-            remove(copy);
-        }
-    }
-    TrackHost::Node write(double from, double until)
-    {
-        const double start = time(from, until);
-        const std::u16string name = newName();
-        return m_chance.oneIn(2) ? addMemo(name.c_str(), start) : addMemo(name.c_str(), start, start + time(0.04, 5.0));
-    }
-    /// On a frame.
-    double time(double from, double until)
-    {
-        const auto frames = static_cast<std::uint64_t>((until - from) * 25.0);
-        return from + static_cast<double>(m_chance.below(frames)) / 25.0;
-    }
-    std::u16string newName()
-    {
-        const std::string number = std::to_string(++m_count);
-        return *m_names.emplace(number.begin(), number.end()).first;
-    }
-
-    Chance& m_chance;
-    std::function<void(const std::string&)> m_following;
-    std::set<std::u16string> m_names; ///< of the memos that have to be somewhere
-    int m_count = 0;
-};
-
-RC_GTEST_PROP(MemoSyncLaw, NoMemoThatTheUserHasNotRemovedIsLost, ())
-{
-    SeededChance chance(*rc::gen::noShrink(rc::gen::resize(rc::kNominalSize, rc::gen::arbitrary<std::uint64_t>())));
-    BusyUser user(chance);
-    for (std::uint64_t count = 1 + chance.below(20); count > 0; --count) {
-        user.editSomething();
-        user.requireAll();
-    }
-
-    user.endPreview();
-
-    user.requireAll();
 }
 
 } // namespace cadrel::host
