@@ -89,9 +89,10 @@ TEST(NotesCsv, AMoveBetweenReelsNamesTheReelOfEachPlace)
     const std::string second = cut("002", "A002", "11:00:00:00 11:00:10:00", "02:00:00:00 02:00:10:00");
     const std::string inFirst = cut("003", "A003", "12:00:00:00 12:00:04:00", "01:00:10:00 01:00:14:00");
     const std::string inSecond = cut("003", "A003", "12:00:00:00 12:00:04:00", "02:00:10:00 02:00:14:00");
+    const std::vector<std::string> rate{"--rate", "24 fps"};
 
-    const auto toFirst = cellsOf(Cuts(first + second + inSecond, first + inFirst + second).file(".csv"));
-    const auto toSecond = cellsOf(Cuts(first + inFirst + second, first + second + inSecond).file(".csv"));
+    const auto toFirst = cellsOf(Cuts(first + second + inSecond, first + inFirst + second).file(".csv", rate));
+    const auto toSecond = cellsOf(Cuts(first + inFirst + second, first + second + inSecond).file(".csv", rate));
 
     ASSERT_EQ(toFirst.size(), 2U);
     EXPECT_EQ(cellOf(toFirst, 1, "action"), "move");
