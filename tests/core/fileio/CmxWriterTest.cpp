@@ -549,8 +549,7 @@ TEST(CmxWriter, NamesTheFilesOfAListBeforeItWritesThem)
     EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 999), Paths{L"/a/reel.edl"});
     EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 1000), (Paths{L"/a/reel_1.edl", L"/a/reel_2.edl"}));
     EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 1998), (Paths{L"/a/reel_1.edl", L"/a/reel_2.edl"}));
-    EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 1999),
-              (Paths{L"/a/reel_1.edl", L"/a/reel_2.edl", L"/a/reel_3.edl"}));
+    EXPECT_EQ(CmxWriter::filesOf(L"/a/reel.edl", 1999), (Paths{L"/a/reel_1.edl", L"/a/reel_2.edl", L"/a/reel_3.edl"}));
 }
 
 TEST(CmxWriter, SaysTheFrameCountModeOfDropFrameAlone)
