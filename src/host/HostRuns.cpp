@@ -191,7 +191,8 @@ Result::Type Host::runCadrel()
             project.createMarkerTracks(transaction);
             const Result::Type ran = run(changeList);
             if (ran == Result::Cancelled) {
-                // If the run can't be undone, it stays, and must not look complete.
+                // Without them the run stays, and must not look complete. If they refuse the undo, the name was given
+                // before, and the failure alone tells of it.
                 actions = required(service<IActionManager>(m_context));
                 return;
             }

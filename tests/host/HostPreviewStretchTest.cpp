@@ -468,6 +468,50 @@ TEST_P(HostPreviewStretchTest, TakesAwayNothingOfTheFilmForARecordThatIsDamaged)
     }
 }
 
+// The preview of another project from which a track was imported.
+
+TEST_P(HostPreviewStretchTest, LetsMemosFollowWhateverATrackAboveTheirsKeepsOfAnotherPreview)
+{
+    addMemos({{u"click", 6.0}});
+    previewAll();
+    host.edit(u"Import", [&] { writeNumbers(host.context(), *track, AttributeKey::Preview, {5000.0}); });
+
+    moveTo(standin::tests::childrenOf(*memos).back(), 11.0);
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 1-1", "click 86411-86411"}));
+}
+
+TEST_P(HostPreviewStretchTest, TakesCopiesAwayThatMemosHaveFollowedWhateverATrackAboveTheirsKeepsOfAnotherPreview)
+{
+    addMemos({{u"click", 6.0}});
+    previewAll();
+    moveTo(standin::tests::childrenOf(*memos).back(), 11.0);
+    host.edit(u"Import",
+              [&] { writeNumbers(host.context(), *track, AttributeKey::Preview, {host.inHost(0.0) + 0.5}); });
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos), Texts{"click 1-1"});
+}
+
+TEST_P(HostPreviewStretchTest, LeavesTheAutomationOfTheFilmWhereATrackKeepsARecordOfAnotherPreviewThere)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    const Node other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addPoint(other, volume, host.inHost(3.0), 0.25F);
+    host.addPoint(other, volume, host.inHost(15.0), 0.75F);
+    previewAll();
+    const double start = host.inHost(12.0);
+    host.edit(u"Import", [&] { writeNumbers(host.context(), *track, AttributeKey::Preview, {start, start + 1.0}); });
+
+    adapter().setPreviewActive(false);
+
+    std::vector<double> points;
+    for (const Node& point : standin::tests::childrenOf(*host.curveOf(other, volume)))
+        points.push_back(point->getStart(nullptr));
+    EXPECT_EQ(points, (std::vector<double>{host.inHost(3.0), host.inHost(15.0)}));
+}
+
 // Memos.
 
 TEST_P(HostPreviewStretchTest, LeavesAMemoThatTheUserHasWrittenWhereTheNewCutHasNothing)

@@ -86,6 +86,16 @@ public:
     }
 };
 
+/// Actions of a host that carries out none.
+class RefusingActions : public Implements<RefusingActions, FObject, IActionManager> {
+public:
+    static constexpr const char* ClassName = "RefusingActions";
+
+    int32 addHandler(IActionHandler*) override { return ResultFalse; }
+    int32 removeHandler(IActionHandler*) override { return ResultFalse; }
+    int32 invoke(const char*, const char*, int32) override { return ResultFalse; }
+};
+
 /// A film of two clips of ten seconds that change places.
 class HostRunTest : public AtEachOrigin {
 protected:
@@ -968,6 +978,28 @@ TEST_P(HostRunTest, SaysThatItIsIncompleteWhereItIsCancelledAndCannotBeTakenBack
 
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
     EXPECT_EQ(heard.results, Results{Result::HostObjectMissing});
+    EXPECT_FALSE(host.isEditOpen());
+    EXPECT_FALSE(host.application.idleManager().isBlocked());
+    EXPECT_EQ(progress->calls.back(), "end");
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.bytes(), before);
+}
+
+TEST_P(HostRunTest, TellsThatItIsIncompleteWhereTheHostRefusesToTakeItBack)
+{
+    const std::string before = requestRun();
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") != std::string::npos)
+            progress->cancel();
+    };
+    host.altered.replace(IActionManager::iid, makeCounted<RefusingActions>());
+
+    host.idle();
+
+    // The name was given before.
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    EXPECT_EQ(heard.results, Results{Result::HostCallFailed});
     EXPECT_FALSE(host.isEditOpen());
     EXPECT_FALSE(host.application.idleManager().isBlocked());
     EXPECT_EQ(progress->calls.back(), "end");

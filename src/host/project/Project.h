@@ -10,7 +10,9 @@
 #include "core/time/FramerateProvider.h"
 #include "host/project/MediaPool.h"
 #include "host/project/MemoSync.h"
+#include "host/project/PreviewRecord.h"
 #include "host/project/ProjectEnd.h"
+#include "host/track/EventReach.h"
 #include "host/track/ProjectListener.h"
 #include "host/track/Track.h"
 #include "host/track/TrackIndexes.h"
@@ -26,6 +28,7 @@
 #include <array>
 #include <cstdint>
 #include <limits>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -190,8 +193,8 @@ public:
     void rememberWritten();
     /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
     /// since stays, and so does what he has moved, renamed, slipped or given another length, clip or content; a copy that he
-    /// has changed in no other way than by its gain or the like goes. Automation in the stretch stays only on tracks on which nothing was
-    /// written.
+    /// has changed in no other way than by its gain or the like goes. Automation in the stretch goes from the start of what
+    /// was written on its track.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces, in seconds of the project's clock: the range that the user restricts it to, or else the day that
@@ -244,6 +247,8 @@ private:
     bool isPreviewing() const;
     /// With the rate and the time origin of when it was written.
     MemoSync::Previewed previewed();
+    /// What is kept of the preview that stands there: by the memos' track or, where it keeps nothing, by the first that does.
+    std::optional<PreviewRecord::Head> writtenHead();
     /// Of the last event of any track, from the time origin.
     double contentEnd();
     /// Of the last automation point.
@@ -298,7 +303,7 @@ private:
     void deleteRange(Velmark::IEditTransaction& transaction, double start, double end);
     void moveBack(Velmark::IEditTransaction& transaction, std::vector<Track>& tracks, double start, double end);
     /// Whether something stands on the tracks in the part of a source that would come to stand before the earliest place.
-    bool isLeftOut(const std::vector<const Track*>& tracks, const core::SecondsRange& source, double destination) const;
+    bool isLeftOut(const std::vector<const Track*>& tracks, const core::SecondsRange& source, double destination);
     void writeDestinationMarker(Velmark::IEditTransaction& transaction, const core::EventBase& event);
     void tick(std::uint64_t steps);
 
@@ -320,6 +325,8 @@ private:
     /// Where startWriting has begun, from the time origin.
     std::optional<double> m_writingFrom;
     std::vector<std::uint32_t> m_leftOutEvents;
+    /// Of each track that was asked, since startWriting. What the cuts read doesn't change until completeApply.
+    std::map<const Velmark::ITrackNode*, EventReach> m_sources;
     std::optional<std::vector<Track>> m_tracksOfEdit; ///< from startWriting to rememberWritten
     std::vector<Track> m_lockedTracks;
     core::ProgressHandlerBase* m_progress = nullptr;

@@ -10,11 +10,11 @@
 #include "core/time/SecondsRange.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
-#include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
 #include "host/track/AutomationCurve.h"
 #include "host/track/CoveredRanges.h"
 #include "host/track/CutEvent.h"
+#include "host/track/EventReach.h"
 #include "host/track/Instant.h"
 #include "host/track/Marker.h"
 #include "util/Result.h"
@@ -115,6 +115,15 @@ std::vector<const Track*> pointersTo(const std::vector<Track>& tracks)
     return pointers;
 }
 
+/// From the time origin.
+EventReach reachOf(const Track& track)
+{
+    std::vector<SecondsRange> events;
+    for (const auto& event : childrenOf(*required(query<IProjectNode>(track.node()))))
+        events.push_back({event->getStart(nullptr), event->getEnd(nullptr)});
+    return EventReach(std::move(events));
+}
+
 /// The text of an EDL as the host can take it: one that is no UTF-8 has "?" for all that isn't ASCII.
 std::string hostText(std::string text)
 {
@@ -210,7 +219,7 @@ void Project::processCut(IEditTransaction& transaction, core::Cut& cut)
 //     earliest place             |
 //     new place             |--------------|
 //     left out              |----|
-bool Project::isLeftOut(const std::vector<const Track*>& tracks, const SecondsRange& source, double destination) const
+bool Project::isLeftOut(const std::vector<const Track*>& tracks, const SecondsRange& source, double destination)
 {
     const double length = source.end - source.start;
     SecondsRange place{destination, std::min(destination + length, earliestPlace())};
@@ -223,7 +232,10 @@ bool Project::isLeftOut(const std::vector<const Track*>& tracks, const SecondsRa
         return false;
     const double toHost = source.start - destination - timeOrigin();
     return std::ranges::any_of(tracks, [&](const Track* track) {
-        return !eventsReachingInto(*track, place.start + toHost, place.end + toHost).empty();
+        auto sources = m_sources.find(track->node());
+        if (sources == m_sources.end())
+            sources = m_sources.emplace(track->node(), reachOf(*track)).first;
+        return sources->second.reachesInto({place.start + toHost, place.end + toHost});
     });
 }
 

@@ -68,17 +68,6 @@ std::optional<core::SecondsRange> writtenStretch(const std::vector<Track>& track
     return stretch;
 }
 
-/// The earliest; nothing when no track has written anything down.
-std::optional<double> writtenStart(const std::vector<Track>& tracks)
-{
-    std::optional<double> start;
-    for (const Track& track : tracks) {
-        if (const auto head = PreviewRecord::headKeptBy(track))
-            start = std::min(start.value_or(head->start), head->start);
-    }
-    return start;
-}
-
 std::vector<Node> pointsIn(IProjectNode& curve, const core::SecondsRange& stretch)
 {
     std::vector<Node> points = childrenOf(curve);
@@ -101,6 +90,7 @@ void Project::startWriting()
     ensurePreviewOffset();
     m_writingFrom = requiredOffset() - timeOrigin();
     m_leftOutEvents.clear();
+    m_sources.clear();
     m_tracksOfEdit.reset();
     m_tracksOfEdit = conformedTracks();
 }
@@ -138,8 +128,8 @@ void Project::clearPreview(IEditTransaction& transaction)
 {
     setTracksLocked(false);
     const std::vector<Track> tracks = cadrelTracks();
-    if (const auto start = writtenStart(tracks))
-        removeFollowed(transaction, *start);
+    if (const auto head = writtenHead())
+        removeFollowed(transaction, head->start);
     if (const auto stretch = writtenStretch(tracks)) {
         SparedContent spared(transaction);
         FirstFailure failure;
@@ -147,12 +137,13 @@ void Project::clearPreview(IEditTransaction& transaction)
             for (const Track& track : tracks) {
                 spared.takeOff(track.container(), usersEvents(track, *stretch));
                 const std::optional<PreviewRecord> record = PreviewRecord::keptBy(track);
+                core::SecondsRange users = *stretch;
                 if (record && record->end()) {
-                    removePoints(transaction, track, *stretch);
-                    continue;
+                    users.end = record->start();
+                    removePoints(transaction, track, {users.end, stretch->end});
                 }
                 for (const Node& curve : curvesOf(*track.node()))
-                    spared.takeOff(curve, pointsIn(*curve, *stretch));
+                    spared.takeOff(curve, pointsIn(*curve, users));
             }
             deleteRange(transaction, stretch->start + timeOrigin(), stretch->end + timeOrigin());
         });
@@ -224,18 +215,25 @@ MemoSync::Previewed Project::previewed()
 {
     const double offset = requiredOffset();
     const double origin = timeOrigin();
-    double written = offset - origin;
-    std::optional<core::Framerate> framerate;
-    for (const Track& track : cadrelTracks()) {
-        if (const auto record = PreviewRecord::headKeptBy(track)) {
-            written = record->start;
-            framerate = record->framerate;
-            break;
-        }
-    }
+    const PreviewRecord::Head written = writtenHead().value_or(PreviewRecord::Head{offset - origin, {}, {}});
     // Neither the time origin nor the rate moves what was written.
-    return {m_previewEvents->events(), framerate ? *framerate : getFramerate(), offset, origin,
-            written - (offset - origin)};
+    return {m_previewEvents->events(), written.framerate ? *written.framerate : getFramerate(), offset, origin,
+            written.start - (offset - origin)};
+}
+
+// A track that comes from another project may keep what was written there, and above all of this one's.
+std::optional<PreviewRecord::Head> Project::writtenHead()
+{
+    findMarkerTracks();
+    if (const Track& memos = markerTrack(TrackRole::Memos); memos.isAlive()) {
+        if (const auto head = PreviewRecord::headKeptBy(memos))
+            return head;
+    }
+    for (const Track& track : cadrelTracks()) {
+        if (const auto head = PreviewRecord::headKeptBy(track))
+            return head;
+    }
+    return std::nullopt;
 }
 
 double Project::latestPoint(const std::vector<Track>& tracks) const

@@ -4,7 +4,8 @@
 
 namespace cadrel::host {
 
-/// What has become of the new video in a run or preview. Where nothing is written, its track stays as it is.
+/// What has become of the new video in a run or preview. Where nothing is written, the track of the new video keeps what
+/// stands on it. Unless the user has locked it, the run or preview carries that over by the change list, as on any track.
 enum class VideoWriting {
     Done,             ///< or there is nothing to write
     WithoutBeginning, ///< some of it would stand before the project begins, and is left out

@@ -9,6 +9,8 @@
 #include "host/track/CutEvent.h"
 #include "standin/project/Envelope.h"
 #include "standin/project/Track.h"
+#include "tests/support/NotQuadratic.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/EventMaking.h"
 #include "tests/support/core/NoMarkers.h"
@@ -34,8 +36,10 @@
 using namespace Velmark;
 using cadrel::core::MarkerEntry;
 using cadrel::core::MarkerKind;
+using cadrel::tests::expectNotQuadratic;
 using cadrel::tests::makeEvent;
 using cadrel::tests::RecordingProgress;
+using cadrel::tests::secondsOf;
 using cadrel::tests::switchMarkersOff;
 using cadrel::tests::thrownBy;
 using cadrel::util::Result;
@@ -318,6 +322,45 @@ TEST_P(ProjectEditsTest, ACutIsCopiedToThePreview)
 
     EXPECT_EQ(contentOf(fx), (Content{"door 8-12", "steps 13-18", "car 19-25", "preview: door 30-32",
                                       "preview: steps 33-38", "preview: car 39-40"}));
+}
+
+// Each cut takes a frame from after 01:00:00:00 to after 00:30:00:00.
+TEST(ProjectCuts, ThatWouldStandBeforeTheProjectBeginsAreNotQuadraticInTheirSources)
+{
+    for (const double origin : {3600.0, 36000.0}) {
+        SCOPED_TRACE(origin);
+        expectNotQuadratic(1000, [origin](int count) {
+            const cadrel::tests::TestProject timecodes;
+            TrackHost host(origin);
+            switchMarkersOff(host.adapter.model().settings());
+            const auto track = host.addTrack(TypeWord::Audio, u"FX");
+            const auto timecode = [](const char* begin, int frame) {
+                return core::Timecode(core::Timecode(begin).toFrameCount() + frame);
+            };
+            std::vector<std::shared_ptr<core::EventBase>> changes;
+            for (int frame = 0; frame < 2 * count; frame += 2) {
+                host.addClip(track, u"shot", frame / 25.0, (frame + 1) / 25.0);
+                changes.push_back(std::make_shared<core::EventBase>());
+                changes.back()->setTimecodes(timecode("01:00:00:00", frame), timecode("01:00:00:00", frame + 1),
+                                             timecode("00:30:00:00", frame), timecode("00:30:00:00", frame + 1));
+            }
+
+            double seconds = 0.0;
+            host.edit(u"Cuts", [&] {
+                host.adapter.startWriting();
+                std::vector<std::shared_ptr<core::Cut>> cuts;
+                for (const auto& change : changes)
+                    cuts.push_back(host.adapter.makeCut(change));
+                seconds = secondsOf([&] {
+                    for (const auto& cut : cuts)
+                        host.adapter.processCut(*host.transaction(), *cut);
+                });
+                host.adapter.rememberWritten();
+            });
+            EXPECT_EQ(host.adapter.leftOutEvents().size(), origin > 3600.0 ? 0U : changes.size());
+            return seconds;
+        });
+    }
 }
 
 TEST_P(ProjectEditsTest, TracksOfTheSameSourceRangeAreCopiedTogether)
