@@ -184,7 +184,7 @@ private:
         if (m_document.sound != nullptr)
             writeLines("Sound: ", SoundWording(*m_document.sound).totals());
         writeLines("", m_words.settings());
-        m_sink(concatenated({"<p>", NotesWording::Order, "</p>\n"}));
+        m_sink(concatenated({"<p>", escaped(m_words.order()), "</p>\n"}));
     }
 
     void writeLines(const std::string& title, const std::vector<std::string>& lines)
@@ -468,7 +468,7 @@ private:
                cell("tc", escaped(m_words.action(entry))) +
                cell("", isStep ? changesOf(*entry.step()) + feet + soundOf(entry) : moveOf(entry)) +
                cell("tc num", entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange)) +
-               cell("tc num", m_words.change(entry.runningOffset)) + "</tr>\n";
+               cell("tc num", m_words.offsetInColumn(entry, reel)) + "</tr>\n";
     }
 
     static std::string filtersOf(const NoteEntry& entry)

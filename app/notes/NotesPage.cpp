@@ -151,11 +151,12 @@ function filter() {
     row.hidden = !row.dataset.kinds.split(' ').some(kind => shown.has(kind));
     if (row.hidden) left.add(row.id);
   });
-  marks.forEach(mark => mark.classList.toggle('off', left.has(rowsOf(mark)[0])));
-  const note = document.querySelector('.left');
-  note.hidden = left.size === 0;
-  note.textContent = `Left out: ${boxes.filter(b => !b.checked).map(b => b.parentElement.innerText.trim()).join(', ')}. ` +
-    `${steps.filter(row => !row.hidden).length} of ${steps.length} steps are shown.`;
+  marks.forEach(mark => mark.classList.toggle('off',
+    !shown.has(mark.classList[0]) || rowsOf(mark).every(id => left.has(id))));
+  const note = document.querySelector('.left'), off = boxes.filter(b => !b.checked);
+  note.hidden = off.length === 0;
+  note.textContent = `Left out: lines that are only ${off.map(b => b.parentElement.innerText.trim()).join(', ')}, ` +
+    `and ${off.length > 1 ? 'those colours' : 'that colour'} in the picture. ${steps.filter(row => !row.hidden).length} of ${steps.length} steps are shown.`;
 }
 boxes.forEach(box => box.addEventListener('change', filter));
 show();

@@ -136,7 +136,7 @@ private:
         }
         for (const std::string& line : m_words.settings())
             addText(line, BodyFont, Dim, 13);
-        addText(std::string(NotesWording::Order), BodyFont, Ink, 13);
+        addText(m_words.order(), BodyFont, Ink, 13);
     }
 
     /// What the files of a cut call it, or their names where they don't; of many titles the first and the last.
@@ -295,7 +295,7 @@ private:
             line({std::to_string(reel + 1), m_words.reelStart(reel), m_words.timecode(reels[reel].before),
                   m_words.timecode(reels[reel].after), m_words.change(reels[reel].after - reels[reel].before),
                   std::to_string(steps)},
-                 TimeFont, steps == 0 ? Dim : Ink);
+                 TimeFont, reels[reel].isUnchanged() ? Dim : Ink);
         }
     }
 
@@ -337,8 +337,14 @@ private:
     void addRow(const NoteEntry& entry, std::size_t reel)
     {
         if (entry.step() == nullptr) {
-            add(10.5,
-                [this, &entry, reel](PdfPages&, double top) { drawTimes(entry, reel, top + 8, SmallTimeFont, Dim); });
+            Lines shots;
+            if (entry.moveEnd() != nullptr)
+                shots.emplace_back(m_words.describe(entry.moveEnd()->move).shot, Dim);
+            const double height = 10.5 + static_cast<double>(shots.size()) * LineHeight;
+            add(height, [this, &entry, reel, shots = std::move(shots)](PdfPages& pages, double top) {
+                drawTimes(entry, reel, top + 8, SmallTimeFont, Dim);
+                drawLines(pages, shots, top + 8);
+            });
             return;
         }
         const Lines lines = linesOf(entry);
@@ -423,7 +429,7 @@ private:
         m_pages.text(Margin + 92, y, m_words.action(entry), font, colour);
         if (entry.lengthChange != 0)
             m_pages.textToRight(m_lengthRight, y, m_words.change(entry.lengthChange), font, colour);
-        m_pages.textToRight(m_right, y, m_words.change(entry.runningOffset), font, colour);
+        m_pages.textToRight(m_right, y, m_words.offsetInColumn(entry, reel), font, colour);
     }
 
     void addRemarks()

@@ -94,7 +94,7 @@ public:
         sink(cuts());
         sink(figures());
         sink(soundTotals());
-        sink(concatenated({"\n", wrapped(std::string(NotesWording::Order), {})}));
+        sink(concatenated({"\n", wrapped(m_words.order(), {})}));
         sink(largest());
         sink(reels());
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
@@ -179,8 +179,8 @@ private:
         for (std::size_t reel = 0; reel < all.size(); ++reel)
             text += numberText(reel + 1) + "    " + m_words.reelStart(reel) + "  " +
                     m_words.timecode(all[reel].before) + "  " + m_words.timecode(all[reel].after) + " " +
-                    m_words.change(all[reel].after - all[reel].before) + "  " + numberText(m_words.stepsOf(reel)) +
-                    "\n";
+                    m_words.changeInColumn(all[reel].after - all[reel].before) + "  " +
+                    numberText(m_words.stepsOf(reel)) + "\n";
         return text;
     }
 
@@ -199,12 +199,12 @@ private:
         // Only a step has a change of length, so that there is room for longer words in its place.
         if (entry.step() == nullptr)
             return trimmedEnd(start + padded(m_words.action(entry), ActionWidth + 1 + TimeWidth) +
-                              m_words.change(entry.runningOffset)) +
+                              m_words.offsetInColumn(entry, reel)) +
                    moveText(entry);
         std::string text =
             trimmedEnd(start + padded(m_words.action(entry), ActionWidth + 1) +
                        padded(entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange), TimeWidth) +
-                       m_words.change(entry.runningOffset));
+                       m_words.offsetInColumn(entry, reel));
         for (const PictureChange& change : entry.step()->changes) {
             const ChangeWords words = m_words.describe(change);
             text += trimmedEnd(Indent + padded(words.what, WhatWidth) + "  " + words.shot);
@@ -214,7 +214,7 @@ private:
         if (entry.step()->joined > 1)
             text += Indent + "joined from " + std::to_string(entry.step()->joined) + " trims that cancel out\n";
         if (m_document.layout.showsFeet)
-            text += Indent + m_words.inFeet(entry) + "\n";
+            text += wrapped(Indent + m_words.inFeet(entry), Indent + "  ");
         if (const core::StepSound* const sound = m_words.soundOf(entry))
             text += soundText(*sound);
         return text;
@@ -236,10 +236,9 @@ private:
         const SoundWording words(*m_document.sound);
         text += wrapped(Indent + "sound: " + words.summary(sound), Indent + "  ");
         for (const SoundLine& line : words.lines(sound))
-            text += trimmedEnd(toPrintable(Indent + "  " + padded(line.what, SoundWhatWidth) + " " +
-                                               padded(line.time, SoundTimeWidth) + " " + line.name,
-                                           Width)
-                                   .text);
+            text += wrapped(Indent + "  " + padded(line.what, SoundWhatWidth) + " " +
+                                padded(line.time, SoundTimeWidth) + " " + line.name,
+                            Indent + "    ");
         if (const std::string rest = SoundWording::rest(sound); !rest.empty())
             text += Indent + "  " + rest + "\n";
         return text;

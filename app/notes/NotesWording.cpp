@@ -15,7 +15,6 @@
 #include <array>
 #include <cmath>
 #include <cstdlib>
-#include <sstream>
 
 namespace cadrel::app {
 
@@ -67,6 +66,19 @@ std::string withMore(const std::string& name, std::size_t more)
         return name;
     const std::string text = concatenated({" and ", std::to_string(more), " more"});
     return toPrintable(name, MostCharactersOfAName - text.size()).text + text;
+}
+
+std::string_view titleOf(SettingsReport::Origin origin)
+{
+    switch (origin) {
+    case SettingsReport::Origin::CommandLine:
+        return "Settings given:";
+    case SettingsReport::Origin::Project:
+        return "Settings of the project:";
+    case SettingsReport::Origin::Default:
+        break;
+    }
+    return "Settings by default:";
 }
 
 std::string_view explanationOf(PictureDoubt doubt)
@@ -126,7 +138,23 @@ std::string NotesWording::timecode(std::int32_t frames) const
 
 std::string NotesWording::change(std::int32_t frames) const
 {
-    return concatenated({frames < 0 ? "-" : frames > 0 ? "+" : " ", timecode(std::abs(frames))});
+    return concatenated({frames < 0 ? "-" : frames > 0 ? "+" : "", timecode(std::abs(frames))});
+}
+
+std::string NotesWording::changeInColumn(std::int32_t frames) const
+{
+    return concatenated({frames == 0 ? " " : "", change(frames)});
+}
+
+std::string NotesWording::offsetInColumn(const NoteEntry& entry, std::size_t reel) const
+{
+    const core::KeptStretch* const kept = entry.kept();
+    if (kept == nullptr)
+        return changeInColumn(entry.runningOffset);
+    const auto& notes = m_document.notes;
+    if (notes.reels()[reel].pair.oldReel != notes.oldCut().reelAt(kept->oldStart))
+        return {};
+    return changeInColumn(notes.newTimecode(kept->newStart) - notes.oldTimecode(kept->oldStart));
 }
 
 std::string NotesWording::feet(std::int32_t frames)
@@ -200,8 +228,13 @@ std::string NotesWording::inFeet(const NoteEntry& entry) const
     };
     const std::int32_t place = step->place.frame;
     switch (step->action) {
-    case StepAction::Move:
-        return "take out " + through(step->from.frame, step->moved) + ", insert at " + feet(place);
+    case StepAction::Move: {
+        const auto inReel = [step](std::size_t reel) {
+            return step->from.reel == step->place.reel ? std::string() : " of reel " + std::to_string(reel + 1);
+        };
+        return concatenated({"take out ", through(step->from.frame, step->moved), inReel(step->from.reel),
+                             ", insert at ", feet(place), inReel(step->place.reel)});
+    }
     case StepAction::Relabel:
         return "new version from " + through(place, step->inserted.length);
     case StepAction::Replace:
@@ -257,7 +290,10 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     case ChangeKind::TailTrimmed:
         return {"tail " + signedFrames(change.frames), name, {}};
     case ChangeKind::Lifted:
-        return {(change.isPart ? "part " : "lifted ") + length + oldPlace(), nameOf(change.oldShot), {}};
+        // With its place, a part would be wider than the column.
+        if (change.isPart)
+            return {"lifted part " + length, nameOf(change.oldShot), "in the old cut" + oldPlace()};
+        return {"lifted " + length + oldPlace(), nameOf(change.oldShot), {}};
     case ChangeKind::Inserted: {
         std::string more = materialOf(change);
         if (shot != nullptr && !shot->hasSpeed(1.0))
@@ -334,7 +370,8 @@ std::size_t NotesWording::stepsOf(std::size_t reel) const
 
 std::string NotesWording::shotsOf(const NoteEntry& entry) const
 {
-    return withMore(describe(largestChange(entry)).shot, entry.step()->changes.size() - 1);
+    const PictureChange& largest = largestChange(entry);
+    return withMore(describe(largest).shot, core::otherShots(*entry.step(), largest));
 }
 
 std::string NotesWording::cutName(bool isNew) const
@@ -350,10 +387,11 @@ std::vector<std::string> NotesWording::remarks() const
     std::vector<std::string> lines;
     const core::HealingNotes& healing = m_document.healing;
     if (healing.events > 0) {
-        lines.push_back(counted(healing.events, "event") + " of the change EDL healed from " +
-                        std::to_string(healing.members));
-        if (healing.bridgedGaps > 0)
-            lines.push_back(counted(healing.bridgedGaps, "gap") + " covered by healing");
+        const std::string gaps =
+            healing.bridgedGaps > 0 ? ", " + counted(healing.bridgedGaps, "gap") + " covered" : std::string();
+        lines.push_back(
+            concatenated({"For the change EDL that cadrel makes of these cuts: ", counted(healing.events, "event"),
+                          " healed from ", std::to_string(healing.members), gaps, "; the steps above are not healed"}));
     }
     if (const std::size_t joined = m_document.notes.joinedSteps(); joined > 0)
         lines.push_back(std::to_string(joined) + " trims that cancel out within " +
@@ -412,12 +450,33 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
     }
 }
 
+std::string NotesWording::order() const
+{
+    return concatenated(
+        {"The steps are carried out in order, and their places are those in the programme so far. What is moved is "
+         "taken "
+         "out first; the place after \"to\" is counted without it. ",
+         m_document.notes.reels().size() > 1
+             ? "A reel keeps its start, whatever is put into the others or taken out of them. "
+             : "",
+         "In the lines below a step, \"at\" is a place in the old cut.",
+         m_document.sound != nullptr
+             ? " The time of a clip is its start in the old project; of what is new, and where automation jumps, it is "
+               "that of the new cut."
+             : ""});
+}
+
 std::vector<std::string> NotesWording::settings() const
 {
-    std::istringstream text(m_document.settings.text("Settings: ", std::string::npos));
+    using Origin = SettingsReport::Origin;
     std::vector<std::string> lines;
-    for (std::string line; std::getline(text, line);)
-        lines.push_back(line.substr(line.find_first_not_of(' ')));
+    for (const Origin origin : {Origin::CommandLine, Origin::Project, Origin::Default}) {
+        std::string options;
+        for (const std::string& option : m_document.settings.optionsFrom(origin))
+            options.append(" ").append(option);
+        if (!options.empty())
+            lines.push_back(concatenated({titleOf(origin), options}));
+    }
     return lines;
 }
 

@@ -30,11 +30,6 @@ struct ChangeWords {
 /// Says in words what stands in the notes.
 class NotesWording {
 public:
-    /// How the steps are meant.
-    static constexpr std::string_view Order =
-        "The steps are carried out in order, and their places are those in the programme so far. In the lines below a "
-        "step, \"at\" is a place in the old cut.";
-
     explicit NotesWording(const NotesDocument& document) : m_document(document) {}
 
     /// Of a frame count. It begins anew after 24 hours, which a reel may reach on its way to a shorter one. Drop-frame shows
@@ -44,6 +39,11 @@ public:
     std::string plainTimecode(std::int32_t frames) const;
     /// A length with its sign.
     std::string change(std::int32_t frames) const;
+    /// The same for a column: zero has a blank in place of a sign.
+    std::string changeInColumn(std::int32_t frames) const;
+    /// For a column: by how much later a kept stretch stands now, and of any other row what the reel has gained so far.
+    /// Empty for a stretch from another reel.
+    std::string offsetInColumn(const core::NoteEntry& entry, std::size_t reel) const;
     /// 35 mm feet and frames, 16 frames a foot: "12+05". The first frame of a reel is 0+00.
     static std::string feet(std::int32_t frames);
 
@@ -54,7 +54,8 @@ public:
     ChangeWords describe(const core::PictureChange& change) const;
     /// The change of a step that stands for it where there is room for one.
     static const core::PictureChange& largestChange(const core::NoteEntry& entry);
-    /// Feet and frames of the row, counted inclusively: "at 12+05 delete through 13+04"; empty for a row that is no step.
+    /// Feet and frames of the row, counted inclusively: "delete 12+05 through 13+04"; empty for a row that is no step. A
+    /// move between reels names them, as each has feet of its own.
     std::string inFeet(const core::NoteEntry& entry) const;
     /// "Reel 1, 03:00:00:00".
     std::string reelTitle(std::size_t reel) const;
@@ -68,9 +69,11 @@ public:
     std::string cutName(bool isNew) const;
     /// How many steps a reel has.
     std::size_t stepsOf(std::size_t reel) const;
-    /// The largest change of a step, and how many more there are: "42A-3 MAREN MCU and 2 more".
+    /// The shot of the largest change of a step, and how many more shots it changes: "42A-3 MAREN MCU and 2 more".
     std::string shotsOf(const core::NoteEntry& entry) const;
-    /// The settings in force, a line for each place that they are from: "Settings: command line --simplify 12".
+    /// How the steps and the lines below them are meant.
+    std::string order() const;
+    /// The settings in force, a line for each place that they are from: "Settings given: --simplify 12".
     std::vector<std::string> settings() const;
     /// The names of the files of a cut, its number of events and of flawed ones.
     std::string cutText(bool isNew) const;

@@ -28,6 +28,8 @@ constexpr std::size_t MostNames = 4;
 constexpr std::size_t MostCharactersOfATrack = 24;
 constexpr std::size_t MostCharactersOfAScene = 40;
 constexpr std::size_t MostCharactersOfAClip = 40;
+/// Of the tracks of a jump, as many are named as have room in so many columns.
+constexpr std::size_t MostColumnsOfAJump = 60;
 
 /// "a, b, c and 2 more"; `names` are the first of `count`.
 std::string listOf(const std::vector<std::string>& names, std::size_t count)
@@ -39,6 +41,21 @@ std::string listOf(const std::vector<std::string>& names, std::size_t count)
 std::string nameOf(const std::string& utf8, std::size_t mostCharacters)
 {
     return utf8.empty() ? "(no name)" : toPrintable(utf8, mostCharacters).text;
+}
+
+/// "a, b and 2 more"; one is named however long it is.
+std::string fittingList(const std::vector<std::string>& names)
+{
+    std::vector<std::string> shown;
+    std::size_t columns = 0;
+    for (const std::string& name : names) {
+        const std::string text = nameOf(name, MostCharactersOfATrack);
+        columns += (shown.empty() ? 0 : 2) + toPrintable(text).width;
+        if (!shown.empty() && columns > MostColumnsOfAJump)
+            break;
+        shown.push_back(text);
+    }
+    return listOf(shown, names.size());
 }
 
 /// "3 trimmed, 2 split": those that aren't 0.
@@ -137,8 +154,7 @@ std::vector<SoundLine> SoundWording::lines(const StepSound& sound) const
     for (const AutomationJump& jump : sound.jumps) {
         if (lines.size() == MostLines)
             return lines;
-        lines.push_back({"automation jumps", timecode(jump.place.start),
-                         toPrintable(joined(jump.tracks), 2 * MostCharactersOfAClip).text});
+        lines.push_back({"automation jumps", timecode(jump.place.start), fittingList(jump.tracks)});
     }
     return lines;
 }
@@ -172,7 +188,7 @@ std::string SoundWording::whatOf(const SoundChange& change) const
     case SoundChangeKind::Split:
         return lost > core::SameInstant ? "split, -" + length : "split";
     case SoundChangeKind::Doubled:
-        return "once more at " + timecode(change.now->start);
+        return "once more, at " + timecode(change.now->start) + " now";
     case SoundChangeKind::FellOut:
         return lost > core::SameInstant ? "fell out, " + length : "fell out";
     case SoundChangeKind::Added:

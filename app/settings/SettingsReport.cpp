@@ -170,28 +170,36 @@ void SettingsReport::add(const SettingEntry& entry, const Settings& settings, co
     m_lines.push_back({entry.name, reading.option, reading.value, given.has(entry) ? Origin::CommandLine : found});
 }
 
+std::vector<std::string> SettingsReport::optionsFrom(Origin origin) const
+{
+    std::vector<std::string> options;
+    for (const Line& setting : m_lines) {
+        if (setting.origin != origin || setting.option.empty())
+            continue;
+        const std::vector<std::string> single = singleOptions(toPrintable(setting.option).text);
+        options.insert(options.end(), single.begin(), single.end());
+    }
+    return options;
+}
+
 std::string SettingsReport::text(const std::string& title, std::size_t width) const
 {
     constexpr std::size_t WordColumn = 14;
     std::string text;
     for (const Origin origin : {Origin::CommandLine, Origin::Project, Origin::Default}) {
         std::string line;
-        for (const Line& setting : m_lines) {
-            if (setting.origin != origin || setting.option.empty())
-                continue;
-            for (const std::string& option : singleOptions(toPrintable(setting.option).text)) {
-                if (line.empty()) {
-                    line = text.empty() ? title : std::string(title.size(), ' ');
-                    line += wordOf(origin);
-                    line.resize(title.size() + WordColumn, ' ');
-                } else if (line.size() + 1 + option.size() > width) {
-                    text += line + "\n";
-                    line = std::string(title.size() + WordColumn, ' ');
-                } else {
-                    line += ' ';
-                }
-                line += option;
+        for (const std::string& option : optionsFrom(origin)) {
+            if (line.empty()) {
+                line = text.empty() ? title : std::string(title.size(), ' ');
+                line += wordOf(origin);
+                line.resize(title.size() + WordColumn, ' ');
+            } else if (line.size() + 1 + option.size() > width) {
+                text += line + "\n";
+                line = std::string(title.size() + WordColumn, ' ');
+            } else {
+                line += ' ';
             }
+            line += option;
         }
         if (!line.empty())
             text += line + "\n";

@@ -38,6 +38,8 @@ public:
     /// A choice that isn't one of the settings, after them.
     void add(Line line) { m_lines.push_back(std::move(line)); }
 
+    /// The options that give the values from there, as they are typed: {"--match clip", "--vfx A,B"}.
+    std::vector<std::string> optionsFrom(Origin origin) const;
     /// Lines of a title, such as "Settings    ", and the options that give these values, by where they are from. A line is
     /// wider only where a single option is.
     std::string text(const std::string& title, std::size_t width = 120) const;

@@ -2,6 +2,7 @@
 
 #include "tests/app/Film.h"
 #include "tests/app/JsonSchema.h"
+#include "tests/app/NotesOfCuts.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/SoundProject.h"
 #include "tests/support/TreePaths.h"
@@ -147,16 +148,29 @@ TEST(ApplyNotes, TellAtEachStepWhatHappenedToTheSound)
     EXPECT_FALSE(tells(text, "where no picture did")) << text;
 }
 
+TEST(ApplyNotes, TheHeadTellsOfWhichCutTheTimesOfTheSoundAre)
+{
+    const std::string sentence = "The time of a clip is its start in the old project; of what is new, and where "
+                                 "automation jumps, it is that of the new cut.";
+    const Sound sound;
+    const std::string paper = sound.folder / "notes.pdf";
+    sound.notes(".pdf");
+
+    for (const std::string& form : {sound.notes(".txt"), sound.notes(".html"), textOfPdf(paper)})
+        EXPECT_TRUE(tells(unbroken(form), sentence)) << form;
+    EXPECT_FALSE(tells(unbroken(Cuts(oldCut(), newCut()).notes().out), sentence));
+}
+
 TEST(ApplyNotes, TheCsvHasColumnsForTheSound)
 {
     const Sound sound;
 
     const std::string csv = sound.notes(".csv");
 
-    EXPECT_TRUE(tells(csv, ",at_feet,from_feet,scenes,sound_trimmed,sound_split,sound_doubled,sound_fell_out,sound_new,"
+    EXPECT_TRUE(tells(csv, ",source_in,scenes,sound_trimmed,sound_split,sound_doubled,sound_fell_out,sound_new,"
                            "sound_moved,sound_tracks,automation_jumps,sound\r\n"))
         << csv;
-    EXPECT_TRUE(tells(csv, "TWO: head -48 frames,15+00,,,0,1,0,1,0,0,DIA,0,"
+    EXPECT_TRUE(tells(csv, "TWO: head -48 frames,15+00,,1,,24 fps,,,0,1,0,1,0,0,DIA,0,"
                            "\"DIA: long line at 01:00:08:00: split, -00:00:02:00; "
                            "DIA: lost at 01:00:10:12: fell out, 00:00:01:00\"\r\n"))
         << csv;
@@ -276,8 +290,9 @@ TEST(ApplyNotes, NamesCantBreakThePageOrActInASpreadsheet)
     EXPECT_TRUE(tells(csv, ",'@SUM(1),0,1,0,1,0,0,'=CMD(),0,\"'=CMD(): <script>\"\"&?[31m? at 01:00:08:00: split"))
         << csv;
 
-    for (const char* const extension : {".txt", ".pdf"})
-        EXPECT_FALSE(tells(sound.notes(extension), "\x1b[")) << extension;
+    EXPECT_FALSE(tells(sound.notes(".txt"), "\x1b["));
+    sound.notes(".pdf");
+    EXPECT_FALSE(tells(textOfPdf(sound.folder / "notes.pdf"), "\x1b["));
     EXPECT_EQ(stepOf(sound.notesAsJson(), 1).at("sound").at("changes")[0].at("name"), "<script>\"&\x1b[31m\n");
 }
 
@@ -341,7 +356,7 @@ TEST(ApplyNotes, WhatChangesWhereNoPictureDidIsToldElsewhere)
                                                     "      sound: 1 fell out, on Tail\n"
                                                     "        fell out, 00:00:05:00 01:00:40:00    Tail: tail pop\n"));
     EXPECT_TRUE(tells(sound.notes(".html", keepCut), "<h2>Sound that changed where no picture did</h2>\n<details"));
-    EXPECT_TRUE(tells(sound.notes(".csv", keepCut), "\r\n,,elsewhere,,,,,,,,,,,,,,,,,,,,0,0,0,1,0,0,Tail,0,"));
+    EXPECT_TRUE(tells(sound.notes(".csv", keepCut), "\r\n,,elsewhere,,,,,,,,,,,,,,,,,,,,,,,,0,0,0,1,0,0,Tail,0,"));
 }
 
 TEST(ApplyNotes, OfCutsWithoutAChangeTellThatNothingHasChanged)

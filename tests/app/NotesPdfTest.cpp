@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <gtest/gtest.h>
+#include <map>
 #include <regex>
 #include <string>
 #include <vector>
@@ -115,6 +116,56 @@ TEST(NotesPdf, OfSeveralTitlesTheFirstAndTheLastStandInTheHead)
     EXPECT_EQ(outcome.status, 0) << outcome.err;
     const std::string text = unbroken(textOfPdf(file));
     EXPECT_TRUE(text.starts_with("Change notes ONE ... THREE to SAME Old cut: ")) << text;
+}
+
+/// The colours of the starts of reels in the list of reels, from above.
+std::vector<std::string> coloursInListOfReels(const std::string& file)
+{
+    const Outcome outcome = runProgram("pdftohtml", {"-xml", "-stdout", "-i", file});
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    static const std::regex Font("<fontspec id=\"([0-9]+)\"[^>]*color=\"(#[0-9a-f]{6})\"");
+    static const std::regex Text("<text top=\"([0-9]+)\"[^>]*font=\"([0-9]+)\">(.*)</text>");
+    const std::sregex_iterator end;
+    std::map<std::string, std::string> colours;
+    for (std::sregex_iterator match(outcome.out.begin(), outcome.out.end(), Font); match != end; ++match)
+        colours[(*match)[1]] = (*match)[2];
+    int first = 0;
+    int last = 0;
+    for (std::sregex_iterator match(outcome.out.begin(), outcome.out.end(), Text); match != end; ++match) {
+        if ((*match)[3] == "<b>The reels</b>")
+            first = std::stoi((*match)[1]);
+        if ((*match)[3] == "<b>Reel 1, 01:00:00:00</b>")
+            last = std::stoi((*match)[1]);
+    }
+    std::map<int, std::string> fromAbove;
+    for (std::sregex_iterator match(outcome.out.begin(), outcome.out.end(), Text); match != end; ++match) {
+        const int top = std::stoi((*match)[1]);
+        if (top > first && top < last && (*match)[3].str().find(":00:00:00") != std::string::npos)
+            fromAbove[top] = colours[(*match)[2]];
+    }
+    std::vector<std::string> inOrder;
+    for (const auto& [top, colour] : fromAbove)
+        inOrder.push_back(colour);
+    return inOrder;
+}
+
+TEST(NotesPdf, OnlyAReelWhereNothingHasChangedIsGrey)
+{
+    const auto reels = [](bool isMoved) {
+        return cut("001", "ONE", "10:00:00:00 10:00:20:00", "01:00:00:00 01:00:20:00") +
+               cut("002", "MOVED", "10:00:00:00 10:00:10:00",
+                   isMoved ? "01:00:20:00 01:00:30:00" : "02:00:20:00 02:00:30:00") +
+               cut("003", "TWO", "10:00:00:00 10:00:20:00", "02:00:00:00 02:00:20:00") +
+               cut("004", "THREE", "10:00:00:00 10:00:20:00", "03:00:00:00 03:00:20:00");
+    };
+    const Cuts film(reels(false), reels(true));
+
+    film.file(".pdf", {"--rate", "24 fps"});
+
+    // The second reel has no step of its own, and has lost a shot. Ink is 11, 12 and 13 hundredths of 255, and grey 42, 45
+    // and 48 hundredths, each without what is less than 1.
+    EXPECT_EQ(coloursInListOfReels(film.folder / "notes.pdf"),
+              (std::vector<std::string>{"#1c1e21", "#1c1e21", "#6b727a"}));
 }
 
 TEST(NotesPdf, TheSameNotesAreTheSameFileWhateverTheTime)

@@ -6,7 +6,9 @@
 #include "tests/support/TreePaths.h"
 
 #include <algorithm>
+#include <array>
 #include <cstddef>
+#include <cstdio>
 #include <gtest/gtest.h>
 #include <map>
 #include <nlohmann/json.hpp>
@@ -141,19 +143,29 @@ TEST(Notes, LongNamesOfFilesMakeNoLineWider)
         EXPECT_LE(columnsOf(line), 80) << line;
 }
 
+/// A page with its quotes as they are read.
+std::string withQuotes(std::string html)
+{
+    for (std::size_t at = 0; (at = html.find("&quot;", at)) != std::string::npos;)
+        html.replace(at, 6, 1, '"');
+    return html;
+}
+
 TEST(Notes, TheSettingsAndTheOrderOfTheStepsStandInTheHeadOfThePageAndThePaper)
 {
     const Cuts film(oldCut(), newCut());
     const std::vector<std::string> settings{"--heal", "gaps", "--vfx", "VFX_****_v,_comp"};
-    const std::string order = "The steps are carried out in order, and their places are those in the programme so far.";
+    const std::string order = "The steps are carried out in order, and their places are those in the programme so far. "
+                              "What is moved is taken out first; the place after \"to\" is counted without it.";
 
     film.file(".pdf", settings);
     const std::string paper = unbroken(textOfPdf(film.folder / "notes.pdf"));
-    const std::string page = unbroken(film.file(".html", settings));
+    const std::string page = unbroken(withQuotes(film.file(".html", settings)));
 
     for (const std::string& form : {paper, page}) {
-        EXPECT_NE(form.find("Settings: command line --heal gaps --vfx 'VFX_****_v,_comp'"), std::string::npos) << form;
-        EXPECT_NE(form.find("default --match roll"), std::string::npos) << form;
+        EXPECT_NE(form.find("Settings given: --heal gaps --vfx 'VFX_****_v,_comp'"), std::string::npos) << form;
+        EXPECT_NE(form.find("Settings by default: --match roll"), std::string::npos) << form;
+        EXPECT_EQ(form.find("command line"), std::string::npos) << form;
         EXPECT_NE(form.find(order), std::string::npos) << form;
         EXPECT_LT(form.find(order), form.find("The largest changes"));
     }
@@ -218,11 +230,12 @@ TEST(Notes, TheCsvHasARowAStepAndFixedColumns)
 
     EXPECT_EQ(film.file(".csv"),
               "\xEF\xBB\xBFstep,reel,action,at,from,delete,insert,move,delete_frames,insert_frames,move_frames,"
-              "length_change_frames,offset_frames,kinds,roll,clip,old_in,new_in,changes,at_feet,from_feet\r\n"
+              "length_change_frames,offset_frames,kinds,roll,clip,old_in,new_in,changes,at_feet,from_feet,"
+              "at_reel,from_reel,rate,source_in\r\n"
               "1,1,replace,01:00:10:00,,00:00:02:00,,,48,0,0,-48,-48,head-trimmed,A002,TWO,01:00:10:00,,"
-              "TWO: head -48 frames,15+00,\r\n"
+              "TWO: head -48 frames,15+00,,1,,24 fps,\r\n"
               "2,1,replace,01:00:18:00,,,00:00:04:00,,0,96,0,96,48,inserted,B009,NEW,,01:00:18:00,"
-              "\"NEW: inserted 00:00:04:00, roll B009, source 05:00:00:00\",27+00,\r\n");
+              "\"NEW: inserted 00:00:04:00, roll B009, source 05:00:00:00\",27+00,,1,,24 fps,05:00:00:00\r\n");
 }
 
 TEST(Notes, ACsvTextIsNoFormulaAndKeepsItsQuotes)
@@ -427,9 +440,9 @@ TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
 std::vector<std::string> remarksIn(const json& notes)
 {
     const json& healed = notes.at("healed");
-    std::vector<std::string> lines{std::to_string(healed.at("events").get<int>()) +
-                                   " event of the change EDL healed from " +
-                                   std::to_string(healed.at("members").get<int>())};
+    std::vector<std::string> lines{
+        "For the change EDL that cadrel makes of these cuts: " + std::to_string(healed.at("events").get<int>()) +
+        " event healed from " + std::to_string(healed.at("members").get<int>()) + "; the steps above are not healed"};
     for (const char* const side : {"old", "new"}) {
         std::map<std::string, int> counts;
         for (const json& doubt : notes.at(side).at("doubts")) {
@@ -466,9 +479,7 @@ TEST(Notes, WhatIsHealedDoubtedAndNotReadStandsInEveryForm)
     const std::string pdf = film.folder / "notes.pdf";
     film.file(".pdf");
     const std::string text = film.notes().out;
-    std::string html = film.file(".html");
-    for (std::size_t at = 0; (at = html.find("&quot;", at)) != std::string::npos;)
-        html.replace(at, 6, 1, '"');
+    const std::string html = withQuotes(film.file(".html"));
 
     ASSERT_EQ(notes.at("old").at("unread").size(), 7U);
     // The head of the old cut has two lines, and each of its three shots has two.
@@ -537,13 +548,179 @@ TEST(Notes, APlaceAfterMidnightBeginsTheDayAnew)
     EXPECT_NE(outcome.out.find("move 00:00:05:00 from 00:00:10:00"), std::string::npos) << outcome.out;
 }
 
+/// Two reels, of which the second begins with A002 in the new cut, and the first ends with it in the old one.
+struct TwoReels : Cuts {
+    TwoReels()
+        : Cuts(one() + cut("002", "A002", "10:00:00:00 10:00:10:00", "01:00:20:00 01:00:30:00") +
+                   cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:00:00 02:00:30:00"),
+               one() + cut("002", "A002", "10:00:00:00 10:00:10:00", "02:00:00:00 02:00:10:00") +
+                   cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:10:00 02:00:40:00"))
+    {
+    }
+
+    static std::string one() { return cut("001", "A001", "10:00:00:12 10:00:20:12", "01:00:00:00 01:00:20:00"); }
+};
+
+/// The last five seconds of a reel of fifteen come to its start.
+struct ChangedPlaces : Cuts {
+    ChangedPlaces()
+        : Cuts(cut("001", "A001", "10:00:00:12 10:00:10:12", "01:00:00:00 01:00:10:00") +
+                   cut("002", "A002", "10:00:00:00 10:00:05:00", "01:00:10:00 01:00:15:00"),
+               cut("001", "A002", "10:00:00:00 10:00:05:00", "01:00:00:00 01:00:05:00") +
+                   cut("002", "A001", "10:00:00:12 10:00:10:12", "01:00:05:00 01:00:15:00"))
+    {
+    }
+};
+
+TEST(Notes, WhatIsKeptTellsHowMuchLaterItStandsNow)
+{
+    const ChangedPlaces film;
+
+    const std::string text = film.notes({"--rate", "24 fps"}).out;
+    EXPECT_NE(text.find("      01:00:00:00  kept 00:00:05:00, was 01:00:10:00                -00:00:10:00\n"
+                        "      01:00:05:00  kept 00:00:10:00, was 01:00:00:00                +00:00:05:00\n"),
+              std::string::npos)
+        << text;
+    film.file(".pdf", {"--rate", "24 fps"});
+    EXPECT_NE(unbroken(textOfPdf(film.folder / "notes.pdf"))
+                  .find("01:00:00:00 kept 00:00:05:00, was 01:00:10:00 -00:00:10:00 "
+                        "01:00:05:00 kept 00:00:10:00, was 01:00:00:00 +00:00:05:00"),
+              std::string::npos);
+    const std::string page = film.file(".html", {"--rate", "24 fps"});
+    EXPECT_TRUE(std::regex_search(
+        page, std::regex("kept 00:00:05:00, was 01:00:10:00</td>.*<td class=\"tc num\">-00:00:10:00</td></tr>")))
+        << page;
+    EXPECT_TRUE(std::regex_search(
+        page, std::regex("kept 00:00:10:00, was 01:00:00:00</td>.*<td class=\"tc num\">\\+00:00:05:00</td></tr>")))
+        << page;
+}
+
+TEST(Notes, WhatIsKeptFromAnotherReelHasNoOffset)
+{
+    const TwoReels film;
+
+    const std::string page = film.file(".html");
+
+    EXPECT_TRUE(
+        std::regex_search(page, std::regex("kept 00:00:10:00, was 01:00:20:00</td>.*<td class=\"tc num\"></td></tr>")))
+        << page;
+}
+
+TEST(Notes, ThePlaceThatAMoveGoesToIsCountedWithoutIt)
+{
+    // Eleven shots of 100 frames: the third goes between the eighth and the ninth, so that seven are before it.
+    std::string before;
+    std::string after;
+    int place = 0;
+    const auto shot = [](int number, int position) {
+        const auto timecode = [](int hour, int frames) {
+            std::array<char, 50> text{};
+            std::snprintf(text.data(), text.size(), "%02d:%02d:%02d:%02d", hour, frames / 1440 % 60, frames / 24 % 60,
+                          frames % 24);
+            return std::string(text.data());
+        };
+        return cut("001", std::string("A").append(std::to_string(number)),
+                   timecode(10, 2000 * number) + " " + timecode(10, 2000 * number + 100),
+                   timecode(1, position * 100) + " " + timecode(1, position * 100 + 100));
+    };
+    for (const int number : {1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11})
+        before += shot(number, number - 1);
+    for (const int number : {1, 2, 4, 5, 6, 7, 8, 3, 9, 10, 11})
+        after += shot(number, place++);
+    const Cuts film(before, after);
+
+    const std::string text = film.notes({"--rate", "24 fps"}).out;
+
+    // 700 frames are 29 seconds and 4 frames.
+    EXPECT_NE(text.find("   1  01:00:08:08  move 00:00:04:04 to 01:00:29:04"), std::string::npos) << text;
+    EXPECT_NE(unbroken(text).find("What is moved is taken out first; the place after \"to\" is counted without it."),
+              std::string::npos)
+        << text;
+}
+
+TEST(Notes, OfSeveralReelsTheHeadTellsThatEachKeepsItsStart)
+{
+    const std::string sentence = "A reel keeps its start, whatever is put into the others or taken out of them.";
+    const TwoReels two;
+    const Cuts one(oldCut(), newCut());
+
+    two.file(".pdf");
+    for (const std::string& form : {two.notes().out, two.file(".html"), textOfPdf(two.folder / "notes.pdf")})
+        EXPECT_NE(unbroken(form).find(sentence), std::string::npos) << form;
+    for (const std::string& form : {one.notes().out, one.file(".html")})
+        EXPECT_EQ(unbroken(form).find(sentence), std::string::npos) << form;
+}
+
+TEST(Notes, FeetOfAMoveBetweenReelsNameBoth)
+{
+    const TwoReels two;
+    const ChangedPlaces one;
+
+    // 20 s are 480 frames, 30 feet; 10 s more end with frame 719, 44 feet and 15 frames.
+    const std::string between = "take out 30+00 through 44+15 of reel 1, insert at 0+00 of reel 2";
+    two.file(".pdf", {"--feet"});
+    for (const std::string& form :
+         {two.notes({"--feet"}).out, two.file(".html", {"--feet"}), textOfPdf(two.folder / "notes.pdf")})
+        EXPECT_NE(unbroken(form).find(between), std::string::npos) << form;
+    // 10 s are 240 frames, 15 feet; 5 s more end with frame 359, 22 feet and 7 frames.
+    const std::string text = one.notes({"--feet", "--rate", "24 fps"}).out;
+    EXPECT_NE(text.find("      take out 15+00 through 22+07, insert at 0+00\n"), std::string::npos) << text;
+}
+
+TEST(Notes, ALengthThatDoesNotChangeHasOneBlankBeforeIt)
+{
+    const ChangedPlaces film;
+
+    const std::string text = film.notes({"--rate", "24 fps"}).out;
+
+    EXPECT_NE(text.find("Length      00:00:15:00 before, 00:00:15:00 after, 00:00:00:00\n"), std::string::npos) << text;
+    EXPECT_NE(film.file(".html", {"--rate", "24 fps"}).find("<b>00:00:00:00</b><span>change of length</span>"),
+              std::string::npos);
+}
+
+TEST(Notes, APartThatIsTakenOutOfAShotIsToldAsLifted)
+{
+    // TWO loses the 3rd to the 7th second, and the shots after it don't change.
+    const Cuts film(oldCut(),
+                    cut("001", "A001", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00") + clipName("ONE") +
+                        cut("002", "A002", "11:00:00:12 11:00:03:12", "01:00:10:00 01:00:13:00") + clipName("TWO") +
+                        cut("003", "A002", "11:00:07:12 11:00:10:12", "01:00:13:00 01:00:16:00") + clipName("TWO") +
+                        cut("004", "A003", "12:00:00:00 12:00:10:00", "01:00:16:00 01:00:26:00") + clipName("THREE"));
+
+    const std::string text = film.notes({"--rate", "24 fps"}).out;
+    EXPECT_NE(text.find("   1  01:00:13:00  delete 00:00:04:00                  -00:00:04:00 -00:00:04:00\n"
+                        "      lifted part 00:00:04:00            TWO\n"
+                        "        in the old cut at 01:00:13:00\n"),
+              std::string::npos)
+        << text;
+    film.file(".pdf", {"--rate", "24 fps"});
+    EXPECT_NE(unbroken(textOfPdf(film.folder / "notes.pdf"))
+                  .find("TWO: lifted part 00:00:04:00, in the old cut at 01:00:13:00"),
+              std::string::npos);
+}
+
+TEST(Notes, GapsThatHealingCoversAreToldOfTheChangeEdl)
+{
+    const TempFolder folder;
+    const std::string file = folder / "notes.json";
+    EXPECT_EQ(runCadrel(reel3({"--heal", "inserts", "-o", file})).status, 0);
+    const json healed = json::parse(contentOf(file)).at("healed");
+    ASSERT_EQ(healed.at("bridgedGaps"), 5);
+
+    const Outcome outcome = runCadrel(reel3({"--heal", "inserts"}));
+
+    EXPECT_NE(unbroken(outcome.out)
+                  .find("For the change EDL that cadrel makes of these cuts: " +
+                        std::to_string(healed.at("events").get<int>()) + " events healed from " +
+                        std::to_string(healed.at("members").get<int>()) +
+                        ", 5 gaps covered; the steps above are not healed"),
+              std::string::npos)
+        << outcome.out;
+}
+
 TEST(Notes, PictureThatGoesToALaterReelIsToldWhereItGoes)
 {
-    const std::string one = cut("001", "A001", "10:00:00:12 10:00:20:12", "01:00:00:00 01:00:20:00");
-    const Cuts film(one + cut("002", "A002", "10:00:00:00 10:00:10:00", "01:00:20:00 01:00:30:00") +
-                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:00:00 02:00:30:00"),
-                    one + cut("002", "A002", "10:00:00:00 10:00:10:00", "02:00:00:00 02:00:10:00") +
-                        cut("003", "A003", "10:00:00:00 10:00:30:00", "02:00:10:00 02:00:40:00"));
+    const TwoReels film;
 
     const Outcome outcome = film.notes();
 
@@ -555,12 +732,14 @@ TEST(Notes, PictureThatGoesToALaterReelIsToldWhereItGoes)
     // The later reel tells of it without a number.
     EXPECT_NE(outcome.out.find("      02:00:00:00  moved 00:00:10:00 from reel 1, step 1            +00:00:10:00\n"
                                "      A002\n"
-                               "      02:00:00:00  kept 00:00:10:00, was 01:00:20:00                +00:00:10:00\n"),
+                               "      02:00:00:00  kept 00:00:10:00, was 01:00:20:00\n"
+                               "      02:00:10:00  kept 00:00:30:00, was 02:00:00:00                +00:00:10:00\n"),
               std::string::npos)
         << outcome.out;
     film.file(".pdf");
     EXPECT_NE(unbroken(textOfPdf(film.folder / "notes.pdf"))
-                  .find("02:00:00:00 moved 00:00:10:00 from reel 1, step 1 +00:00:10:00"),
+                  .find("02:00:00:00 moved 00:00:10:00 from reel 1, step 1 +00:00:10:00 A002 "
+                        "02:00:00:00 kept 00:00:10:00, was 01:00:20:00 02:00:10:00 kept 00:00:30:00"),
               std::string::npos);
     const json told = json::parse(film.file(".json")).at("reels")[1].at("rows")[0];
     EXPECT_EQ(told, json::parse(R"({"row": "moved", "step": 1, "fromReel": 1, "frames": 240, "offsetFrames": 240,

@@ -30,8 +30,10 @@ using Digits = std::array<char, 400>;
 double rounded(double number, double scale)
 {
     constexpr int DigitCount = 15;
+    if (!std::isfinite(number) || scale == 0.0)
+        return number;
     const int decimals = DigitCount - 1 - static_cast<int>(std::floor(std::log10(scale)));
-    if (!std::isfinite(number) || scale == 0.0 || decimals < 0)
+    if (decimals < 0)
         return number;
     Digits digits{};
     const auto [end, failure] =

@@ -57,6 +57,8 @@ MainGui::~MainGui()
     m_fileDialog.removeComponentListener(this);
     closeSheets();
     guardSystem([this] { letGoOfModel(); });
+    // A child that goes with the keyboard hands it to its parent, which would look for the table that is to have it.
+    removeAllChildren();
 }
 
 void MainGui::setNotifier(core::ChangeContextNotificationBase* notifier)

@@ -632,11 +632,11 @@ void expectPrinted(const FormOf& formOf, const EdlFrames& oldCut, const EdlFrame
     const std::string simplified = "--simplify " + std::to_string(notes.at("simplifyFrames").get<int>()) + " ";
     EXPECT_EQ(partingOf(between(text, "Old cut", " Settings "), printed.headBeforeSettings(Form::Text)), "");
     EXPECT_EQ(partingOf(between(text, "Length ", " " + order), printed.headAfterSettings(Form::Text)), "");
-    EXPECT_EQ(partingOf(between(page, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Page)), "");
-    EXPECT_EQ(partingOf(between(paper, "Old cut:", " Settings:"), printed.headBeforeSettings(Form::Paper)), "");
+    EXPECT_EQ(partingOf(between(page, "Old cut:", " Settings "), printed.headBeforeSettings(Form::Page)), "");
+    EXPECT_EQ(partingOf(between(paper, "Old cut:", " Settings "), printed.headBeforeSettings(Form::Paper)), "");
     EXPECT_NE(between(text, " Settings ", "Length ").find(simplified), std::string::npos);
-    EXPECT_NE(between(page, " Settings:", order).find(simplified), std::string::npos);
-    EXPECT_NE(between(paper, " Settings:", order).find(simplified), std::string::npos);
+    EXPECT_NE(between(page, " Settings ", order).find(simplified), std::string::npos);
+    EXPECT_NE(between(paper, " Settings ", order).find(simplified), std::string::npos);
 
     const std::string strips = stripsOfPage(notes, oldCut, newCut);
     EXPECT_NE(between(page, order, start).find(strips), std::string::npos) << between(page, order, start);

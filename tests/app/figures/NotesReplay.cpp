@@ -210,13 +210,14 @@ void NotesReplay::lookAtChanges(const json& step)
         lookAtChange(change, step);
         const std::string kind = change.at("kind");
         const int frames = intOf(change, "frames");
+        const bool isInPlace = kind == "replaced" || kind == "unchanged" || kind == "version-changed";
         if (kind == "head-trimmed" || kind == "tail-trimmed") {
             lost += std::max(0, -frames);
             won += std::max(0, frames);
-        } else if (kind == "lifted" || kind == "replaced" || kind == "unchanged") {
+        } else if (kind == "lifted" || isInPlace) {
             lost += frames;
         }
-        if (kind == "inserted" || kind == "replaced" || kind == "doubled" || kind == "unchanged")
+        if (kind == "inserted" || kind == "doubled" || isInPlace)
             won += frames;
         // A shot that is retimed, or a transition, changes frames without a loss of its own.
         isSimple = isSimple && kind != "retimed" && !kind.starts_with("transition");
@@ -246,8 +247,8 @@ void NotesReplay::lookAtChange(const json& change, const json& step)
                   isConsecutive(m_inserted, m_newCut.frameAt(newIn()), frames),
               "what is inserted", step);
     if (kind == "lifted") {
-        m_phrases.push_back((change.contains("part") ? "part " : "lifted ") + length + " at " +
-                            timecodeOfFrames(oldIn()));
+        m_phrases.push_back((change.contains("part") ? "lifted part " : "lifted ") + length);
+        m_phrases.push_back(" at " + timecodeOfFrames(oldIn()));
     } else if (kind == "inserted") {
         m_phrases.push_back("inserted " + length);
         lookAtSource(change);
@@ -448,7 +449,12 @@ void NotesReplay::showRow(const json& row, std::size_t reel)
     const auto length = [&row](const char* key) { return timecodeOfFrames(intOf(row, key)); };
     const std::string offset = signedTimecode(static_cast<int>(m_tables[reel].size()) - m_before[reel]);
     if (row.at("row") == "kept") {
-        m_rows.push_back({row.at("newIn"), length("frames"), row.at("oldIn"), offset});
+        m_rows.push_back({row.at("newIn"), length("frames"), row.at("oldIn")});
+        // By how much later it stands, which tells nothing of what has come from another reel.
+        const json& old = m_notes.at("reels")[reel].at("old");
+        const int place = old.is_null() ? -1 : timeOf(row.at("oldIn")) - timeOf(old.at("start"));
+        if (place >= 0 && place < intOf(old, "frames"))
+            m_rows.back().push_back(signedTimecode(timeOf(row.at("newIn")) - timeOf(row.at("oldIn"))));
         return;
     }
     if (row.at("row") == "moved") {

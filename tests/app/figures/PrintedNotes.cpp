@@ -8,6 +8,7 @@
 #include <cmath>
 #include <cstdlib>
 #include <initializer_list>
+#include <set>
 
 namespace cadrel::tests {
 
@@ -80,8 +81,14 @@ std::string through(int first, int frames)
 std::string feetOf(const json& step)
 {
     const int place = step.at("at").at("frame");
-    if (step.at("action") == "move")
-        return "take out " + through(step.at("from").at("frame"), step.at("moveFrames")) + ", insert at " + feet(place);
+    if (step.at("action") == "move") {
+        const auto reelOf = [&step](const char* end) {
+            const bool isNamed = step.at("from").at("reel") != step.at("at").at("reel");
+            return isNamed ? " of reel " + std::to_string(step.at(end).at("reel").get<int>()) : std::string();
+        };
+        return "take out " + through(step.at("from").at("frame"), step.at("moveFrames")) + reelOf("from") +
+               ", insert at " + feet(place) + reelOf("at");
+    }
     const int removed = step.at("deleteFrames");
     const int inserted = step.at("insertFrames");
     if (step.at("action") == "relabel")
@@ -142,6 +149,16 @@ std::string firstFour(std::vector<std::string> names, std::size_t columns)
     for (const std::string& name : names)
         text += (text.empty() ? "" : ", ") + cutTo(name, columns);
     return text + (more == 0 ? "" : " and " + std::to_string(more) + " more");
+}
+
+/// As many as have room in 60 columns, and how many more there are.
+std::string firstTracks(const std::vector<std::string>& names)
+{
+    std::string text = cutTo(names.front(), 24);
+    std::size_t shown = 1;
+    for (; shown < names.size() && text.size() + 2 + cutTo(names[shown], 24).size() <= 60; ++shown)
+        text += ", " + cutTo(names[shown], 24);
+    return text + (shown == names.size() ? "" : " and " + std::to_string(names.size() - shown) + " more");
 }
 
 /// Those numbers that aren't 0, each with its word.
@@ -334,8 +351,10 @@ PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
                     counted(static_cast<std::size_t>(std::abs(frames)), "frame"),
                 name,
                 {}};
+    if (kind == "lifted" && change.contains("part"))
+        return {"lifted part " + time, oldName, "in the old cut" + at()};
     if (kind == "lifted")
-        return {(change.contains("part") ? "part " : "lifted ") + time + at(), oldName, {}};
+        return {"lifted " + time + at(), oldName, {}};
     if (kind == "inserted") {
         const bool isRetimed = !now.is_null() && now.at("speed") != 1.0;
         return {"inserted " + time, name, materialOf(change) + (isRetimed ? ", speed " + percent(now) + " %" : "")};
@@ -390,6 +409,29 @@ bool goesOn(const json& step, std::size_t reel)
     return at.at("reel") != number || (from.at("reel") == number && from.at("frame") < at.at("frame"));
 }
 
+/// The change that stands for a step: the first of the longest.
+const json& largestOf(const json& step)
+{
+    const auto extentOf = [](const json& change) {
+        return change.at("kind") == "unchanged" ? 0 : std::abs(change.at("frames").get<int>());
+    };
+    const json* largest = &step.at("changes")[0];
+    for (const json& change : step.at("changes"))
+        largest = extentOf(change) > extentOf(*largest) ? &change : largest;
+    return *largest;
+}
+
+/// The shot of a change, as each cut that has it writes it. What is replaced is another shot.
+std::set<json> shotsIn(const json& change)
+{
+    std::set<json> shots;
+    if (change.contains("newShot"))
+        shots.insert(json{"new", change.at("newShot")});
+    if (change.contains("oldShot") && (shots.empty() || change.at("kind") != "replaced"))
+        shots.insert(json{"old", change.at("oldShot")});
+    return shots;
+}
+
 } // namespace
 
 std::string PrintedNotes::placeOf(const json& row, std::size_t reel) const
@@ -430,16 +472,26 @@ std::string PrintedNotes::action(int step) const
     return actionOf(stepOf(step), m_steps.at(step).reel);
 }
 
+/// Whether a kept stretch stood in the old cut outside of this reel.
+bool PrintedNotes::isFromAnotherReel(const json& kept, std::size_t reel) const
+{
+    const json& old = m_notes.at("reels")[reel].at("old");
+    if (old.is_null())
+        return true;
+    const int place = framesOfTimecode(kept.at("oldIn")) - framesOfTimecode(old.at("start"));
+    return place < 0 || place >= old.at("frames").get<int>();
+}
+
 std::string PrintedNotes::rowOf(const json& row, std::size_t reel, int offset, Form form) const
 {
     const std::string start = line({placeOf(row, reel), actionOf(row, reel)});
     if (row.at("row") == "kept")
-        return line({start, lengthChange(offset)});
+        return line({start, isFromAnotherReel(row, reel) ? "" : lengthChange(row.at("offsetFrames"))});
     if (row.at("row") == "moved") {
         const std::string shot = wordsOf(stepOf(row.at("step")).at("changes")[0]).shot;
         if (form == Form::Page)
-            return line({start, "step", std::to_string(row.at("step").get<int>()) + ":", shot, lengthChange(offset)});
-        return line({start, lengthChange(offset), form == Form::Text ? shot : ""});
+            return line({start, shot, lengthChange(offset)});
+        return line({start, lengthChange(offset), shot});
     }
     std::string below;
     for (const json& change : row.at("changes"))
@@ -456,14 +508,19 @@ std::string PrintedNotes::rowOf(const json& row, std::size_t reel, int offset, F
 
 std::string PrintedNotes::shotsOf(const json& step) const
 {
-    const json& changes = step.at("changes");
-    const auto extentOf = [](const json& change) {
-        return change.at("kind") == "unchanged" ? 0 : std::abs(change.at("frames").get<int>());
-    };
-    const json* largest = &changes[0];
-    for (const json& change : changes)
-        largest = extentOf(change) > extentOf(*largest) ? &change : largest;
-    return withMore(wordsOf(*largest).shot, changes.size() - 1);
+    const json& largest = largestOf(step);
+    std::set<json> told = shotsIn(largest);
+    std::size_t more = 0;
+    for (const json& change : step.at("changes")) {
+        const std::set<json> shots = shotsIn(change);
+        const bool isTold =
+            change.at("kind") == "unchanged" || shots.empty() ||
+            std::any_of(shots.begin(), shots.end(), [&](const json& shot) { return told.contains(shot); });
+        more += isTold ? 0 : 1;
+        if (change.at("kind") != "unchanged")
+            told.insert(shots.begin(), shots.end());
+    }
+    return withMore(wordsOf(largest).shot, more);
 }
 
 std::string PrintedNotes::largest(Form form) const
@@ -545,10 +602,9 @@ std::string PrintedNotes::remarks() const
         joined += step.row->at("joinedSteps") > 1 ? step.row->at("joinedSteps").get<std::size_t>() : 0;
     std::string text;
     if (events > 0)
-        text = line({text, counted(events, "event"), "of the change EDL healed from",
-                     std::to_string(healed.at("members").get<int>())});
-    if (gaps > 0)
-        text = line({text, counted(gaps, "gap"), "covered by healing"});
+        text = "For the change EDL that cadrel makes of these cuts: " + counted(events, "event") + " healed from " +
+               std::to_string(healed.at("members").get<int>()) +
+               (gaps > 0 ? ", " + counted(gaps, "gap") + " covered" : "") + "; the steps above are not healed";
     if (joined > 0)
         text = line({text, std::to_string(joined), "trims that cancel out within",
                      counted(m_notes.at("simplifyFrames").get<std::size_t>(), "frame"), "are joined"});
@@ -612,7 +668,7 @@ std::vector<PrintedNotes::SoundLine> PrintedNotes::soundLines(const json& sound)
         else if (kind == "split")
             what = hasLost ? "split, -" + frames : "split";
         else if (kind == "doubled")
-            what = "once more at " + start("now");
+            what = "once more, at " + start("now") + " now";
         else if (kind == "fell-out")
             what = hasLost ? "fell out, " + frames : "fell out";
         const std::string part = change.contains("part") ? " (in " + cutTo(change.at("part"), 40) + ")" : std::string();
@@ -622,11 +678,8 @@ std::vector<PrintedNotes::SoundLine> PrintedNotes::soundLines(const json& sound)
              cutTo(change.at("trackName"), 24) + ": " + (name.empty() ? "(no name)" : cutTo(name, 40)) + part});
     }
     for (const json& jump : sound.at("automationJumps")) {
-        std::string tracks;
-        for (const std::string track : jump.at("tracks"))
-            tracks += (tracks.empty() ? "" : ", ") + track;
         lines.push_back({"automation jumps", exactTimecode(jump.at("in").at("seconds").get<double>() + originOf(jump)),
-                         cutTo(tracks, 80)});
+                         firstTracks(jump.at("tracks"))});
     }
     return lines;
 }
@@ -644,9 +697,7 @@ std::string PrintedNotes::soundOf(const json& sound, Form form) const
     for (std::size_t index = 0; index < std::min(lines.size(), MostLines); ++index) {
         const auto& [what, time, name] = lines[index];
         if (form == Form::Text) {
-            // The columns before the name: 8 blanks, 21 and a blank, 14 and a blank.
-            const std::size_t before = 8 + std::max<std::size_t>(21, what.size()) + 1 + 14 + 1;
-            text = line({text, what, time, cutTo(name, 80 - before)});
+            text = line({text, what, time, name});
         } else if (form == Form::Page) {
             text = line({text, time, name, what});
         } else {
@@ -703,14 +754,14 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
     const int removed = step.at("deleteFrames");
     const int inserted = step.at("insertFrames");
     const auto time = [](int frames) { return frames == 0 ? "" : timecodeOfFrames(frames); };
-    const json& first = step.at("changes")[0];
-    const auto placeIn = [&first](const char* side) {
-        return first.contains(side) ? first.at(side).at("in").get<std::string>() : "";
+    const json& largest = largestOf(step);
+    const auto placeIn = [&largest](const char* side) {
+        return largest.contains(side) ? largest.at(side).at("in").get<std::string>() : "";
     };
     const json none{{"roll", ""}, {"clip", ""}};
-    const json& shot = first.contains("newShot")   ? first.at("newShot")
-                       : first.contains("oldShot") ? first.at("oldShot")
-                                                   : none;
+    const json& shot = largest.contains("newShot")   ? largest.at("newShot")
+                       : largest.contains("oldShot") ? largest.at("oldShot")
+                                                     : none;
     std::string kinds;
     std::string changes;
     for (const json& change : step.at("changes")) {
@@ -737,7 +788,11 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
                                          placeIn("new"),
                                          changes,
                                          feet(step.at("at").at("frame")),
-                                         isMove ? feet(step.at("from").at("frame")) : ""};
+                                         isMove ? feet(step.at("from").at("frame")) : "",
+                                         std::to_string(step.at("at").at("reel").get<int>()),
+                                         isMove ? std::to_string(step.at("from").at("reel").get<int>()) : "",
+                                         m_notes.at("rate"),
+                                         largest.value("sourceIn", "")};
     std::string row;
     for (const std::string& cell : cells)
         row += (row.empty() ? "" : ",") + inQuotes(cell);

@@ -47,6 +47,7 @@ private:
     std::string materialOf(const nlohmann::json& change) const;
     std::string actionOf(const nlohmann::json& row, std::size_t reel) const;
     std::string placeOf(const nlohmann::json& row, std::size_t reel) const;
+    bool isFromAnotherReel(const nlohmann::json& kept, std::size_t reel) const;
     std::string rowOf(const nlohmann::json& row, std::size_t reel, int offset, Form form) const;
     std::string changeOf(const nlohmann::json& change, Form form) const;
     std::string largest(Form form) const;

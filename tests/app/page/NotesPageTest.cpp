@@ -558,6 +558,21 @@ TEST_F(NotesPage, TheFilterShowsTheChosenKindsInTheTableAndInThePicture)
     EXPECT_EQ(browser.valueOf("document.querySelector('tr.on').dataset.kinds.split(' ').includes('lifted')"), true);
 }
 
+TEST_F(NotesPage, TheMarksOfAKindThatIsLeftOutAreGoneWhereTheirLineStays)
+{
+    const std::string shownMarks = "all('svg .lifted').filter(e => getComputedStyle(e).display !== 'none').length";
+    ASSERT_EQ(count(shownMarks), 10);
+
+    tabTo(".tools input[value=\"lifted\"]");
+    browser.press("Space");
+
+    // Steps that are of another kind, too, keep their lines.
+    EXPECT_EQ(count(shownMarks), 0);
+    EXPECT_EQ(count("shownRows('lifted')"), 5);
+    EXPECT_EQ(browser.valueOf("document.querySelector('.left').textContent"),
+              "Left out: lines that are only lifted, and that colour in the picture. 58 of 62 steps are shown.");
+}
+
 TEST_F(NotesPage, ALineOfTheLargestChangesLeadsToItsStep)
 {
     tabTo("ol.largest a");
@@ -606,8 +621,8 @@ TEST_F(NotesPage, SaysOnPaperWhatIsLeftOut)
 
     const std::string paper = textOnPaper(browser, *s_folder);
 
-    EXPECT_NE(paper.find("Left out: kept, trimmed, "), std::string::npos) << paper;
-    EXPECT_NE(paper.find("2 of 62 steps are shown."), std::string::npos) << paper;
+    EXPECT_NE(paper.find("Left out: lines that are only kept, trimmed, "), std::string::npos) << paper;
+    EXPECT_NE(paper.find("and those colours in the picture. 2 of 62 steps are shown."), std::string::npos) << paper;
 }
 
 } // namespace
