@@ -698,6 +698,98 @@ TEST_P(HostPreviewStretchTest, FollowsWhatTheUserHasMadeOfCopiesMeanwhileOnceAno
     EXPECT_EQ(host.contentOf(memos), (Texts{"click 1-1", "pop is too loud 7-7", "hiss 8.5-8.5"}));
 }
 
+TEST_P(HostPreviewStretchTest, AMemoKeepsTheNameThatItIsGivenWhereItsCopyWasOnlyMovedMeanwhile)
+{
+    addMemos({{u"click", 6.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    reopen([&] { moveTo(standin::tests::childrenOf(*memos)[1], 11.0); });
+
+    rename(standin::tests::childrenOf(*memos)[0], u"tick");
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"tick 1-1", "click 86411-86411"}));
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(memos), Texts{"tick 1-1"});
+}
+
+TEST_P(HostPreviewStretchTest, AMemoStaysWhereItIsTakenWhereItsCopyWasOnlyRenamedMeanwhile)
+{
+    addMemos({{u"click", 6.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    reopen([&] { rename(standin::tests::childrenOf(*memos)[1], u"tick"); });
+
+    moveTo(standin::tests::childrenOf(*memos)[0], 8.0 - Day);
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"tick 8-8", "tick 86416-86416"}));
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(memos), Texts{"tick 8-8"});
+}
+
+TEST_P(HostPreviewStretchTest, WhatIsDoneToAMemoCountsMoreThanWhatWasDoneToItsCopyMeanwhile)
+{
+    addMemos({{u"click", 6.0}, {u"pop", 7.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    reopen([&] {
+        const std::vector<Node> all = standin::tests::childrenOf(*memos);
+        rename(all[2], u"knock");
+        moveTo(all[3], 19.0);
+    });
+    const std::vector<Node> all = standin::tests::childrenOf(*memos);
+
+    host.edit(u"Edit", [&] {
+        requireOk(all[0]->setName(nullptr, standin::tests::text(u"tick").get(), 0));
+        requireOk(all[1]->setStart(nullptr, 0, host.inHost(8.0)));
+    });
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"tick 6-6", "pop 8-8", "knock 86416-86416", "pop 86419-86419"}));
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(memos), (Texts{"tick 6-6", "pop 8-8"}));
+}
+
+TEST_P(HostPreviewStretchTest, FollowsACopyThatWasTakenBackMeanwhileToWhereItWasWritten)
+{
+    for (const bool isFollowed : {true, false}) {
+        SCOPED_TRACE(isFollowed);
+        addMemos({{u"click", 6.0}, {u"pop", 7.0}});
+        adapter().setPreviewActive(true);
+        host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+        host.idle();
+        moveTo(standin::tests::childrenOf(*memos)[2], 11.0);
+        ASSERT_EQ(host.contentOf(memos), (Texts{"click 1-1", "pop 7-7", "click 86411-86411", "pop 86417-86417"}));
+        reopen([&] { moveTo(standin::tests::childrenOf(*memos)[2], 16.0); });
+
+        if (isFollowed)
+            rename(standin::tests::childrenOf(*memos)[3], u"bang");
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(host.contentOf(memos),
+                  isFollowed ? (Texts{"click 6-6", "bang 7-7"}) : (Texts{"click 1-1", "pop 7-7", "click 86416-86416"}));
+        host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(host.root(), memos.get())); });
+    }
+}
+
+TEST_P(HostPreviewStretchTest, FollowsACopyThatWasGivenBackItsNameMeanwhile)
+{
+    addMemos({{u"click", 6.0}, {u"pop", 7.0}});
+    adapter().setPreviewActive(true);
+    host.preview(firstChange()); // 0 s to 10 s, shown from 10 s on
+    host.idle();
+    rename(standin::tests::childrenOf(*memos)[2], u"tick");
+    ASSERT_EQ(host.contentOf(memos)[0], "tick 6-6");
+    reopen([&] { rename(standin::tests::childrenOf(*memos)[2], u"click"); });
+
+    moveTo(standin::tests::childrenOf(*memos)[3], 18.0);
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop 8-8", "click 86416-86416", "pop 86418-86418"}));
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(memos), (Texts{"click 6-6", "pop 8-8"}));
+}
+
 TEST_P(HostPreviewStretchTest, LeavesTheMemoOfACopyThatWasRemovedWhileTheSystemWasNotThere)
 {
     addMemos({{u"click", 6.0}, {u"pop", 7.0}});

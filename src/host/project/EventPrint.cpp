@@ -95,7 +95,6 @@ std::uint32_t placePrintOf(IProjectNode& event)
 {
     ByteArchive bytes;
     addPlace(bytes, event);
-    addContent(bytes, event);
     return printOf(bytes);
 }
 

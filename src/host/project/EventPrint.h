@@ -17,7 +17,7 @@ namespace cadrel::host {
 std::uint32_t namePrintOf(Velmark::IProjectNode& event);
 /// Made of its name, of the file that it plays, and of all that a part holds.
 std::uint32_t contentPrintOf(Velmark::IProjectNode& event);
-/// Made of where it stands, too.
+/// Made of where it stands and of what of its clip it plays, and of nothing else.
 std::uint32_t placePrintOf(Velmark::IProjectNode& event);
 
 /// A time of a project in instants, of which all that are the same are equal.

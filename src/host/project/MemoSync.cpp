@@ -4,7 +4,7 @@
 
 #include "core/edl/EventBase.h"
 #include "host/border/HostFailure.h"
-#include "host/project/EventPrint.h"
+#include "host/project/MemoMark.h"
 #include "host/project/MemoPlaces.h"
 #include "host/project/PlacedMemos.h"
 #include "host/project/PreviewRecord.h"
@@ -13,18 +13,14 @@
 #include "host/track/Marker.h"
 #include "host/track/Track.h"
 #include "util/Result.h"
-#include "velmark/Attributes.h"
 
 #include <algorithm>
 #include <cmath>
-#include <functional>
 #include <limits>
 #include <optional>
 #include <utility>
 
 using cadrel::core::SecondsRange;
-using Velmark::AttributeKey;
-using Velmark::FVariant;
 using Velmark::IEditTransaction;
 using Velmark::IHostContext;
 
@@ -45,10 +41,18 @@ std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
     return ids;
 }
 
-/// What was pasted from the real programme has never been marked.
-bool wasMarked(const HostEvent& copy)
+/// Which sides of a copy the user has edited.
+struct Edited {
+    bool name;
+    bool place;
+};
+
+/// Since it was marked. What isn't marked may have been edited in each way.
+Edited editedSinceMark(const HostEvent& copy)
 {
-    return copy.node()->hasAttribute(AttributeKey::Followed) == Velmark::ResultOk;
+    const auto mark = MemoMark::keptBy(*copy.node());
+    const MemoMark now = MemoMark::of(*copy.node());
+    return {!mark || mark->name != now.name, !mark || mark->place != now.place};
 }
 
 /// Whether its timecodes are frames under that rate, which needn't be that of the project.
@@ -205,16 +209,14 @@ MemoSync::Preview MemoSync::previewOf(const PlacedMemos& memos, const Previewed&
 /// What the memos do when the user has edited their copies.
 class MemoSync::Following {
 public:
-    Following(IHostContext* context, const Track& memos, const Preview& preview, const std::set<std::int64_t>& knownIds,
-              IEditTransaction& transaction)
-        : m_hostContext(context), m_memos(memos), m_preview(preview), m_adrift(idsOf(preview.adrift)),
-          m_knownIds(knownIds), m_transaction(transaction), m_newIds(memos)
+    Following(const MemoSync& sync, const Track& memos, const Preview& preview, IEditTransaction& transaction)
+        : m_sync(sync), m_memos(memos), m_preview(preview), m_adrift(idsOf(preview.adrift)), m_transaction(transaction),
+          m_newIds(memos)
     {
     }
 
-    /// The memos have stood as placed. What the copies were like is null where that isn't known.
-    void follow(PlacedMemos placed, double previewStart,
-                const std::function<const Remembered*(const Shown&)>& rememberedOf)
+    /// The memos have stood as placed.
+    void follow(PlacedMemos placed, double previewStart)
     {
         for (const PlacedMemo& memo : placed.all()) {
             if (isBefore(memo.span.start, previewStart))
@@ -225,7 +227,7 @@ public:
                 placed = PlacedMemos(m_memos);
                 m_changed = CoveredRanges();
             }
-            followStretch(placed, shown, rememberedOf(shown));
+            followStretch(placed, shown, m_sync.rememberedOf(shown));
         }
     }
 
@@ -295,7 +297,8 @@ private:
     bool hasOneMemo(const PlacedMemo& copy) const
     {
         const auto count = m_counts.find(copy.id);
-        return count != m_counts.end() && count->second == 1 && !m_knownIds.contains(copy.id) && wasMarked(copy.event);
+        return count != m_counts.end() && count->second == 1 && !m_sync.m_knownIds.contains(copy.id) &&
+               MemoMark::keptBy(*copy.event.node()); // what was pasted from the real programme has none
     }
 
     /// The memos that a stretch shows.
@@ -338,12 +341,11 @@ private:
     void carryOver(const HostEvent& copy, PlacedMemo& placed, const Stretch& stretch, const std::optional<Memo>& before)
     {
         HostEvent& memo = placed.event;
-        // The memo may have been edited itself, or by another copy.
         const Memo edited = memoOf(copy);
-        const bool isRenamed = !before || edited.name != before->name;
-        if (isRenamed && memo.getName() != edited.name)
+        const Edited sides = before ? differencesOf(edited, *before) : editedWhereUnknown(copy, memoOf(memo));
+        if (sides.name && memo.getName() != edited.name)
             memo.setName(m_transaction, edited.name);
-        if (before && edited.start == before->start && edited.end == before->end)
+        if (!sides.place)
             return;
 
         // What hangs over an edge of the stretch isn't in the preview, and stays.
@@ -363,14 +365,29 @@ private:
         noteChange({start, std::max(start, memo.getEnd())});
     }
 
+    static Edited differencesOf(const Memo& one, const Memo& other)
+    {
+        return {one.name != other.name, one.start != other.start || one.end != other.end};
+    }
+    /// What was done to the memo itself is the later edit.
+    Edited editedWhereUnknown(const HostEvent& copy, const Memo& memo) const
+    {
+        Edited edited = editedSinceMark(copy);
+        if (const auto before = m_sync.m_behind.find(memo.id); before != m_sync.m_behind.end()) {
+            const Edited later = differencesOf(memo, before->second);
+            edited = {edited.name && !later.name, edited.place && !later.place};
+        }
+        return edited;
+    }
+
     void writeMemoOf(const PlacedMemo& written, const Stretch& stretch)
     {
         HostEvent copy = written.event;
         copy.setUserId(m_newIds.next());
         const SecondsRange span{stretch.toSource(copy.getStart()), stretch.toSource(copy.getEnd())};
         noteChange(span);
-        Marker{span.start, span.end, copy.getName(), {}, copy.getUserId()}.insertInto(m_hostContext, m_transaction,
-                                                                                      m_memos);
+        Marker{span.start, span.end, copy.getName(), {}, copy.getUserId()}.insertInto(m_sync.m_hostContext,
+                                                                                      m_transaction, m_memos);
         markFollowed(copy);
     }
 
@@ -392,11 +409,10 @@ private:
         return unchanged.size() != 1 || unchanged.front() != around;
     }
 
-    IHostContext* m_hostContext;
+    const MemoSync& m_sync;
     const Track& m_memos;
     const Preview& m_preview;
     std::set<std::int64_t> m_adrift;
-    const std::set<std::int64_t>& m_knownIds;
     std::map<std::int64_t, std::size_t> m_counts; ///< of the memos in the real programme, by their ids
     IEditTransaction& m_transaction;
     NewIds m_newIds;
@@ -407,6 +423,7 @@ void MemoSync::forget()
 {
     m_remembered.clear();
     m_knownIds.clear();
+    m_behind.clear();
 }
 
 void MemoSync::forgetCopies(const Events& events)
@@ -425,31 +442,62 @@ void MemoSync::remember(const Track& memos, const Previewed& previewed)
         return;
     auto found = m_remembered;
     std::set<std::int64_t> ids;
+    std::set<std::int64_t> editedIds;
     const Preview preview = previewOf(placed, previewed);
     const auto edited = editedSince(memos, preview.shown);
     for (const Shown& shown : preview.shown) {
         for (const PlacedMemo& copy : shown.copies) {
-            if (edited.contains(copy.event.node()))
+            if (edited.contains(copy.event.node())) {
+                editedIds.insert(copy.id);
                 continue;
+            }
             found[shown.event][shown.piece].copies.insert(memoOf(copy.event));
             ids.insert(copy.id);
         }
     }
+    m_behind = onlyOnes(placed, previewed.offset + previewed.moved, editedIds);
     m_remembered = std::move(found);
     m_knownIds = std::move(ids);
 }
 
+std::map<std::int64_t, MemoSync::Memo> MemoSync::onlyOnes(const PlacedMemos& memos, double end,
+                                                          const std::set<std::int64_t>& ids)
+{
+    std::map<std::int64_t, Memo> found;
+    std::set<std::int64_t> shared;
+    for (const PlacedMemo& memo : memos.all()) {
+        if (isBefore(memo.span.start, end) && ids.contains(memo.id) &&
+            !found.try_emplace(memo.id, memoOf(memo.event)).second)
+            shared.insert(memo.id);
+    }
+    for (const std::int64_t id : shared)
+        found.erase(id);
+    return found;
+}
+
 void MemoSync::markFollowed(const HostEvent& copy)
 {
-    const std::uint32_t print = placePrintOf(*copy.node());
-    requireOk(copy.node()->setAttribute(AttributeKey::Followed, FVariant::integer(print), true));
+    MemoMark::of(*copy.node()).keepOn(*copy.node());
 }
 
 bool MemoSync::isFollowed(const HostEvent& copy)
 {
-    FVariant print;
-    return copy.node()->getAttribute(AttributeKey::Followed, print) == Velmark::ResultOk && print.isInteger() &&
-           print.asInteger() == placePrintOf(*copy.node());
+    const auto mark = MemoMark::keptBy(*copy.node());
+    return mark && *mark == MemoMark::of(*copy.node());
+}
+
+std::vector<PreviewRecord::Node> MemoSync::othersThan(const PreviewRecord& record,
+                                                      std::vector<PreviewRecord::Node> events)
+{
+    const auto firstEdited = std::ranges::stable_partition(events, [](const PreviewRecord::Node& event) {
+                                 const auto mark = MemoMark::keptBy(*event);
+                                 return !mark || *mark == MemoMark::of(*event);
+                             }).begin();
+    const std::vector<PreviewRecord::Node> edited(firstEdited, events.end());
+    events.erase(firstEdited, events.end());
+    events = record.others(std::move(events));
+    events.insert(events.end(), edited.begin(), edited.end());
+    return events;
 }
 
 std::set<const Velmark::IProjectNode*> MemoSync::editedSince(const Track& memos, const std::vector<Shown>& shown)
@@ -464,7 +512,7 @@ std::set<const Velmark::IProjectNode*> MemoSync::editedSince(const Track& memos,
     if (copies.empty())
         return {};
     if (const auto record = PreviewRecord::keptBy(memos))
-        copies = record->others(std::move(copies));
+        copies = othersThan(*record, std::move(copies));
     std::set<const Velmark::IProjectNode*> edited;
     for (const PreviewRecord::Node& copy : copies)
         edited.insert(copy.get());
@@ -477,9 +525,7 @@ void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTrans
     if (placed.all().empty())
         return;
     const Preview preview = previewOf(placed, previewed);
-    Following(m_hostContext, memos, preview, m_knownIds, transaction)
-        .follow(std::move(placed), previewed.offset + previewed.moved,
-                [this](const Shown& shown) { return rememberedOf(shown); });
+    Following(*this, memos, preview, transaction).follow(std::move(placed), previewed.offset + previewed.moved);
 }
 
 const MemoSync::Remembered* MemoSync::rememberedOf(const Shown& shown) const

@@ -4,6 +4,7 @@
 
 #include "core/time/Framerate.h"
 #include "core/time/SecondsRange.h"
+#include "host/project/PreviewRecord.h"
 #include "host/track/HostEvent.h"
 
 #include <cstddef>
@@ -49,7 +50,9 @@ public:
     /// The context outlives this object.
     explicit MemoSync(Velmark::IHostContext* context) : m_hostContext(context) {}
 
-    /// Applies the edits of the copies to their memos. A copy that wasn't remembered is compared with its memo.
+    /// Applies the edits of the copies to their memos. A copy that wasn't remembered is compared with what it is marked as and,
+    /// where it isn't marked, with its memo. What the user has done to the memo itself since the last note counts more than
+    /// what was done to such a copy.
     /// Throws Result::HostObjectMissing and Result::HostCallFailed.
     void follow(const Track& memos, const Previewed& previewed, Velmark::IEditTransaction& transaction);
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise. One that
@@ -64,6 +67,10 @@ public:
     static void markFollowed(const HostEvent& copy);
     /// Whether a copy is as it was when it was written or its memo followed it last.
     static bool isFollowed(const HostEvent& copy);
+    /// Those of the events that aren't as the system has written them. A copy that its memo has followed elsewhere is one of
+    /// them once it was edited again, also where it is as it was written.
+    static std::vector<PreviewRecord::Node> othersThan(const PreviewRecord& record,
+                                                       std::vector<PreviewRecord::Node> events);
 
 private:
     /// Where a previewed event, or what later ones have left of it, comes from and stands, in seconds of the project's
@@ -109,6 +116,9 @@ private:
     static Preview previewOf(const PlacedMemos& memos, const Previewed& previewed);
     static Memo memoOf(const HostEvent& event);
     static Memo firstOf(std::int64_t id, std::wstring name = {});
+    /// Of the memos before a time, in seconds of the project's clock, those of the ids that no other one has.
+    static std::map<std::int64_t, Memo> onlyOnes(const PlacedMemos& memos, double end,
+                                                 const std::set<std::int64_t>& ids);
     /// Of the copies those that their memos haven't followed and that aren't as they were written.
     static std::set<const Velmark::IProjectNode*> editedSince(const Track& memos, const std::vector<Shown>& shown);
 
@@ -116,6 +126,9 @@ private:
     /// By event and piece.
     std::map<std::shared_ptr<core::EventBase>, std::map<std::size_t, Remembered>> m_remembered;
     std::set<std::int64_t> m_knownIds; ///< of those copies
+    /// What the memos in the real programme were like whose copies have an edit that they haven't followed, by their ids;
+    /// those alone that share their id with no other one.
+    std::map<std::int64_t, Memo> m_behind;
 };
 
 } // namespace cadrel::host

@@ -173,7 +173,7 @@ std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRa
 {
     std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
     if (const auto record = PreviewRecord::keptBy(track))
-        events = record->others(std::move(events));
+        events = MemoSync::othersThan(*record, std::move(events));
     return events;
 }
 

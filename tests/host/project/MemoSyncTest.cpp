@@ -20,6 +20,7 @@
 #include <rapidcheck/gtest.h>
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 #include <functional>
 #include <map>
@@ -991,6 +992,41 @@ TEST_P(MemoSyncTest, WhatCouldNotBeFollowedIsFollowedLaterAndStaysUntilThen)
     EXPECT_EQ(copies(), Content());
 }
 
+TEST_P(MemoSyncTest, OfWhatCouldNotBeFollowedOnlyWhatWasEditedIsFollowedLater)
+{
+    const auto cue = addMemo(u"cue", 12.0);
+    const auto loud = addMemo(u"loud", 15.0, 17.0);
+    preview({tenSeconds()});
+    const auto whenCalled = std::exchange(hook->whenCalled, [](const std::string&) {});
+    move(copyOf(u"cue"), 33.0);
+    rename(copyOf(u"loud"), u"louder");
+    hook->whenCalled = whenCalled;
+
+    host.edit(u"Edit", [&] {
+        requireOk(cue->setName(nullptr, text(u"tick").get(), 0));
+        requireOk(loud->setEnd(nullptr, 0, PreviewedMemos::film(18.0)));
+    });
+
+    EXPECT_EQ(film(), (Content{"tick 13", "louder 15-18"}));
+    EXPECT_EQ(copies(), (Content{"cue 33", "louder 35-37"}));
+}
+
+TEST_P(MemoSyncTest, ACopyThatIsTakenBackWhereNobodyFollowsIsFollowedLater)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    move(copyOf(u"cue"), 33.0);
+    ASSERT_EQ(film(), Content{"cue 13"});
+    const auto whenCalled = std::exchange(hook->whenCalled, [](const std::string&) {});
+    move(copyOf(u"cue"), 32.0);
+    hook->whenCalled = whenCalled;
+    ASSERT_EQ(film(), Content{"cue 13"});
+
+    addCopy(u"splash", 38.0);
+
+    EXPECT_EQ(film(), (Content{"cue 12", "splash 18"}));
+}
+
 TEST(MemoSync, IsNotQuadraticInThePreviewedEvents)
 {
     const auto secondsToFollow = [](int eventCount, bool hasMemos) {
@@ -1354,6 +1390,168 @@ RC_GTEST_PROP(MemoSyncLaw, AMemoFollowsItsCopyAndNoOtherChanges, ())
             RC_ASSERT(preview.found() == before);
         }
     }
+}
+
+/// A user who renames and moves memos of the film and their copies, and takes copies back. Now and then nobody follows; then he
+/// edits copies alone. What he has done last of a name or a place counts.
+class BusyUser : public PreviewedMemos {
+public:
+    explicit BusyUser(Chance& chance) : PreviewedMemos(chance.oneIn(2) ? 0.0 : 3600.0), m_chance(chance)
+    {
+        for (int count = 0; count < MemoCount; ++count) {
+            const int length = chance.oneIn(2) ? 0 : 1 + below(50);
+            const Side side{newName(), below(StretchLength - length)};
+            addMemo(side, length);
+            m_memos.push_back({side, side, side, length});
+        }
+        preview({tenSeconds()});
+        RC_ASSERT(copies().size() == static_cast<std::size_t>(MemoCount));
+        m_following = hook->whenCalled;
+        for (const auto& node : childrenOf(*memos)) {
+            auto& nodes = node->getStart(nullptr) < PreviewedMemos::film(Day) ? m_ofFilm : m_copies;
+            nodes[static_cast<std::size_t>(std::stoi(std::string(ConstString(node->getName()).text8())) - 1)] = node;
+        }
+    }
+
+    void editSomething()
+    {
+        const std::size_t entries = host.project.undoList().doneCount();
+        const auto before = m_memos;
+        const bool isFollowed = m_chance.oneIn(2);
+        hook->whenCalled = isFollowed ? m_following : [](const std::string&) {};
+        const auto index = static_cast<std::size_t>(below(MemoCount));
+        const bool isOfFilm = isFollowed && m_chance.oneIn(2);
+        Memo& memo = m_memos[index];
+        Side& side = isOfFilm ? memo.film : memo.copy;
+        const Side old = side;
+        const bool isTakenBack = m_chance.oneIn(3);
+        if (m_chance.oneIn(2))
+            side.name = isTakenBack ? memo.last.name : newName();
+        else
+            side.start = isTakenBack ? memo.last.start : below(StretchLength - memo.length);
+        if (side == old)
+            return;
+        edit((isOfFilm ? m_ofFilm : m_copies)[index], old, side, isOfFilm ? 10.0 : Day + 30.0);
+        if (isFollowed)
+            follow(isOfFilm ? &memo : nullptr, old);
+        RC_LOG() << (isFollowed ? "followed: " : "not followed: ") << testing::PrintToString(film()) << " "
+                 << testing::PrintToString(copies()) << "\n";
+        requireFilm();
+        if (m_chance.oneIn(5) && host.project.undoList().doneCount() > entries) {
+            host.undo();
+            m_memos = before;
+            RC_LOG() << "undone\n";
+            requireFilm();
+        }
+    }
+    void endPreview()
+    {
+        host.adapter.model().setPreviewActive(false);
+        host.edit(u"End", [&] { host.adapter.clearPreview(*host.transaction()); });
+    }
+    void requireFilm()
+    {
+        RC_ASSERT(sorted(film()) == linesOf(&Memo::film, 10, [](const Memo&) { return true; }));
+    }
+    /// Those that no memo has followed.
+    void requireWhatIsLeft()
+    {
+        requireFilm();
+        RC_ASSERT(sorted(copies()) ==
+                  linesOf(&Memo::copy, 30, [](const Memo& memo) { return memo.copy != memo.last; }));
+    }
+
+private:
+    static constexpr int MemoCount = 3;
+    static constexpr int StretchLength = 250;
+
+    /// What can be edited of a memo; the start in frames of its stretch.
+    struct Side {
+        std::string name;
+        int start;
+
+        bool operator==(const Side&) const = default;
+    };
+    struct Memo {
+        Side film;
+        Side copy;
+        Side last; ///< of the copy, when it was written or followed
+        int length;
+    };
+    using Nodes = std::array<TrackHost::Node, MemoCount>;
+
+    /// All copies are followed. The name or place that a memo of the film was given in the same edit stays.
+    void follow(const Memo* edited, const Side& old)
+    {
+        for (Memo& memo : m_memos) {
+            const bool isEdited = &memo == edited;
+            if (memo.copy.name != memo.last.name && (!isEdited || memo.film.name == old.name))
+                memo.film.name = memo.copy.name;
+            if (memo.copy.start != memo.last.start && (!isEdited || memo.film.start == old.start))
+                memo.film.start = memo.copy.start;
+            memo.last = memo.copy;
+        }
+    }
+    void edit(const TrackHost::Node& node, const Side& old, const Side& side, double stretchStart)
+    {
+        host.edit(u"Edit", [&] {
+            if (side.name != old.name)
+                requireOk(node->setName(nullptr, text(wide(side.name).c_str()).get(), 0));
+            else
+                requireOk(node->setStart(nullptr, 0, PreviewedMemos::film(stretchStart + side.start / 25.0)));
+        });
+    }
+    void addMemo(const Side& side, int length)
+    {
+        const double start = 10.0 + side.start / 25.0;
+        if (length == 0)
+            PreviewedMemos::addMemo(wide(side.name).c_str(), start);
+        else
+            PreviewedMemos::addMemo(wide(side.name).c_str(), start, start + length / 25.0);
+    }
+    template <class Wanted>
+    Content linesOf(Side Memo::*which, int stretchStart, const Wanted& isWanted) const
+    {
+        Content lines;
+        for (const Memo& memo : m_memos) {
+            if (!isWanted(memo))
+                continue;
+            const Side& side = memo.*which;
+            std::ostringstream line;
+            line << side.name << " " << stretchStart + side.start / 25.0;
+            if (memo.length > 0)
+                line << "-" << stretchStart + (side.start + memo.length) / 25.0;
+            lines.push_back(line.str());
+        }
+        return sorted(std::move(lines));
+    }
+    static Content sorted(Content lines)
+    {
+        std::ranges::sort(lines);
+        return lines;
+    }
+    static std::u16string wide(const std::string& name) { return {name.begin(), name.end()}; }
+    std::string newName() { return std::to_string(++m_names); }
+    int below(int bound) { return static_cast<int>(m_chance.below(static_cast<std::uint64_t>(bound))); }
+
+    Chance& m_chance;
+    std::function<void(const std::string&)> m_following;
+    std::vector<Memo> m_memos;
+    Nodes m_ofFilm;
+    Nodes m_copies;
+    int m_names = 0;
+};
+
+RC_GTEST_PROP(MemoSyncLaw, TheLastNameAndPlaceCountWhereverTheyWereGiven, ())
+{
+    SeededChance chance(*rc::gen::noShrink(rc::gen::resize(rc::kNominalSize, rc::gen::arbitrary<std::uint64_t>())));
+    BusyUser user(chance);
+    for (std::uint64_t count = 1 + chance.below(20); count > 0; --count)
+        user.editSomething();
+
+    user.endPreview();
+
+    user.requireWhatIsLeft();
 }
 
 } // namespace cadrel::host
