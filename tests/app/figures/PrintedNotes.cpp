@@ -466,7 +466,7 @@ std::string PrintedNotes::rowOf(const json& row, std::size_t reel, int offset, F
     if (row.at("row") == "moved") {
         const std::string shot = wordsOf(stepOf(row.at("step")).at("changes")[0]).shot;
         if (form == Form::Page)
-            return line({start, "step", std::to_string(row.at("step").get<int>()) + ":", shot, lengthChange(offset)});
+            return line({start, shot, lengthChange(offset)});
         return line({start, lengthChange(offset), shot});
     }
     std::string below;
