@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <array>
+#include <optional>
 #include <string>
 
 namespace cadrel::app {
@@ -23,8 +24,8 @@ constexpr std::string_view ByteOrderMark = "\xEF\xBB\xBF";
 constexpr std::string_view LineEnd = "\r\n";
 constexpr std::string_view Titles = "step,reel,action,at,from,delete,insert,move,delete_frames,insert_frames,"
                                     "move_frames,length_change_frames,offset_frames,kinds,roll,clip,old_in,new_in,"
-                                    "changes,at_feet,from_feet";
-constexpr std::size_t TitleCount = 21;
+                                    "changes,at_feet,from_feet,at_reel,from_reel,rate,source_in";
+constexpr std::size_t TitleCount = 25;
 constexpr std::string_view SoundTitles = ",scenes,sound_trimmed,sound_split,sound_doubled,sound_fell_out,sound_new,"
                                          "sound_moved,sound_tracks,automation_jumps,sound";
 
@@ -56,10 +57,11 @@ public:
     {
         const NoteStep& step = *entry.step();
         const bool isMove = step.action == StepAction::Move;
-        const PictureChange& first = step.changes.front();
-        const core::EventBase* const shot = first.newShot != nullptr ? first.newShot : first.oldShot;
+        const PictureChange& largest = NotesWording::largestChange(entry);
+        const core::EventBase* const shot = largest.newShot != nullptr ? largest.newShot : largest.oldShot;
         const auto time = [this](std::int32_t frames) { return frames == 0 ? "" : m_words.plainTimecode(frames); };
         const auto& notes = m_document.notes;
+        const std::optional<core::Timecode> source = notes.sourceOf(largest);
         const std::array<std::string, TitleCount> cells{
             std::to_string(entry.number),
             std::to_string(reel + 1),
@@ -77,11 +79,15 @@ public:
             kindsOf(step),
             shot == nullptr ? "" : asText(toPrintable(shot->rollName()).text),
             shot == nullptr ? "" : asText(toPrintable(shot->clipName()).text),
-            first.inOld ? m_words.plainTimecode(notes.oldTimecode(first.inOld->start)) : "",
-            first.inNew ? m_words.plainTimecode(notes.newTimecode(first.inNew->start)) : "",
+            largest.inOld ? m_words.plainTimecode(notes.oldTimecode(largest.inOld->start)) : "",
+            largest.inNew ? m_words.plainTimecode(notes.newTimecode(largest.inNew->start)) : "",
             asText(changesOf(step)),
             NotesWording::feet(step.place.frame),
-            isMove ? NotesWording::feet(step.from.frame) : ""};
+            isMove ? NotesWording::feet(step.from.frame) : "",
+            std::to_string(step.place.reel + 1),
+            isMove ? std::to_string(step.from.reel + 1) : "",
+            m_document.rate,
+            source ? source->toString() : ""};
         std::string row;
         for (const std::string& cell : cells)
             row.append(row.empty() ? "" : ",").append(cell);

@@ -370,7 +370,8 @@ std::size_t NotesWording::stepsOf(std::size_t reel) const
 
 std::string NotesWording::shotsOf(const NoteEntry& entry) const
 {
-    return withMore(describe(largestChange(entry)).shot, entry.step()->changes.size() - 1);
+    const PictureChange& largest = largestChange(entry);
+    return withMore(describe(largest).shot, core::otherShots(*entry.step(), largest));
 }
 
 std::string NotesWording::cutName(bool isNew) const

@@ -69,7 +69,7 @@ public:
     std::string cutName(bool isNew) const;
     /// How many steps a reel has.
     std::size_t stepsOf(std::size_t reel) const;
-    /// The largest change of a step, and how many more there are: "42A-3 MAREN MCU and 2 more".
+    /// The shot of the largest change of a step, and how many more shots it changes: "42A-3 MAREN MCU and 2 more".
     std::string shotsOf(const core::NoteEntry& entry) const;
     /// How the steps and the lines below them are meant.
     std::string order() const;

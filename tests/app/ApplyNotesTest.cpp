@@ -167,10 +167,10 @@ TEST(ApplyNotes, TheCsvHasColumnsForTheSound)
 
     const std::string csv = sound.notes(".csv");
 
-    EXPECT_TRUE(tells(csv, ",at_feet,from_feet,scenes,sound_trimmed,sound_split,sound_doubled,sound_fell_out,sound_new,"
+    EXPECT_TRUE(tells(csv, ",source_in,scenes,sound_trimmed,sound_split,sound_doubled,sound_fell_out,sound_new,"
                            "sound_moved,sound_tracks,automation_jumps,sound\r\n"))
         << csv;
-    EXPECT_TRUE(tells(csv, "TWO: head -48 frames,15+00,,,0,1,0,1,0,0,DIA,0,"
+    EXPECT_TRUE(tells(csv, "TWO: head -48 frames,15+00,,1,,24 fps,,,0,1,0,1,0,0,DIA,0,"
                            "\"DIA: long line at 01:00:08:00: split, -00:00:02:00; "
                            "DIA: lost at 01:00:10:12: fell out, 00:00:01:00\"\r\n"))
         << csv;
@@ -356,7 +356,7 @@ TEST(ApplyNotes, WhatChangesWhereNoPictureDidIsToldElsewhere)
                                                     "      sound: 1 fell out, on Tail\n"
                                                     "        fell out, 00:00:05:00 01:00:40:00    Tail: tail pop\n"));
     EXPECT_TRUE(tells(sound.notes(".html", keepCut), "<h2>Sound that changed where no picture did</h2>\n<details"));
-    EXPECT_TRUE(tells(sound.notes(".csv", keepCut), "\r\n,,elsewhere,,,,,,,,,,,,,,,,,,,,0,0,0,1,0,0,Tail,0,"));
+    EXPECT_TRUE(tells(sound.notes(".csv", keepCut), "\r\n,,elsewhere,,,,,,,,,,,,,,,,,,,,,,,,0,0,0,1,0,0,Tail,0,"));
 }
 
 TEST(ApplyNotes, OfCutsWithoutAChangeTellThatNothingHasChanged)

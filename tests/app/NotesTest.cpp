@@ -230,11 +230,12 @@ TEST(Notes, TheCsvHasARowAStepAndFixedColumns)
 
     EXPECT_EQ(film.file(".csv"),
               "\xEF\xBB\xBFstep,reel,action,at,from,delete,insert,move,delete_frames,insert_frames,move_frames,"
-              "length_change_frames,offset_frames,kinds,roll,clip,old_in,new_in,changes,at_feet,from_feet\r\n"
+              "length_change_frames,offset_frames,kinds,roll,clip,old_in,new_in,changes,at_feet,from_feet,"
+              "at_reel,from_reel,rate,source_in\r\n"
               "1,1,replace,01:00:10:00,,00:00:02:00,,,48,0,0,-48,-48,head-trimmed,A002,TWO,01:00:10:00,,"
-              "TWO: head -48 frames,15+00,\r\n"
+              "TWO: head -48 frames,15+00,,1,,24 fps,\r\n"
               "2,1,replace,01:00:18:00,,,00:00:04:00,,0,96,0,96,48,inserted,B009,NEW,,01:00:18:00,"
-              "\"NEW: inserted 00:00:04:00, roll B009, source 05:00:00:00\",27+00,\r\n");
+              "\"NEW: inserted 00:00:04:00, roll B009, source 05:00:00:00\",27+00,,1,,24 fps,05:00:00:00\r\n");
 }
 
 TEST(Notes, ACsvTextIsNoFormulaAndKeepsItsQuotes)

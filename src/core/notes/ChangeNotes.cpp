@@ -11,6 +11,7 @@
 #include <algorithm>
 #include <cmath>
 #include <map>
+#include <set>
 #include <utility>
 
 namespace cadrel::core {
@@ -184,6 +185,25 @@ std::int32_t extentOf(const NoteStep& step)
         break;
     }
     return std::max(step.removed, step.inserted.length);
+}
+
+std::size_t otherShots(const NoteStep& step, const PictureChange& named)
+{
+    std::set<const EventBase*> seen{nullptr};
+    const auto isAnother = [&seen](const PictureChange& change) {
+        const EventBase* const shot = change.newShot != nullptr ? change.newShot : change.oldShot;
+        // What a new shot replaces is another shot.
+        const bool isSameInOld = change.oldShot != nullptr && change.kind != ChangeKind::Replaced;
+        const EventBase* const inOld = isSameInOld ? change.oldShot : shot;
+        const bool isSeen = seen.contains(shot) || seen.contains(inOld);
+        seen.insert({shot, inOld});
+        return !isSeen;
+    };
+    isAnother(named);
+    return static_cast<std::size_t>(
+        std::count_if(step.changes.begin(), step.changes.end(), [&](const PictureChange& change) {
+            return &change != &named && change.kind != ChangeKind::Unchanged && isAnother(change);
+        }));
 }
 
 } // namespace cadrel::core

@@ -103,4 +103,8 @@ HealingNotes notesOfHealing(const EventList& changeEdl);
 /// How much picture a step changes, in frames.
 std::int32_t extentOf(const NoteStep& step);
 
+/// How many shots a step changes besides that of `named`, which is one of its changes. A shot counts once, whatever happens
+/// to it; gaps and unchanged picture don't count.
+std::size_t otherShots(const NoteStep& step, const PictureChange& named);
+
 } // namespace cadrel::core

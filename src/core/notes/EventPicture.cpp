@@ -32,11 +32,16 @@ std::string timesOf(const EventBase& event)
     return event.srcIn().toString() + " " + event.srcOut().toString();
 }
 
-/// The material's name without its version. A reversed shot is another material than one that plays forwards.
+/// The material's name without its version.
+std::string plainNameOf(const EventBase& event, const PictureRules& rules)
+{
+    return rules.versions.stripVersion(nameBy(rules.matchBy, event));
+}
+
+/// A reversed shot is another material than one that plays forwards.
 std::string keyOf(const EventBase& event, const PictureRules& rules)
 {
-    return rules.versions.stripVersion(nameBy(rules.matchBy, event)) +
-           (event.isReversed() ? Separator + std::string("reversed") : std::string());
+    return plainNameOf(event, rules) + (event.isReversed() ? Separator + std::string("reversed") : std::string());
 }
 
 /// The first source frame, in a count that rises with the programme.
@@ -49,7 +54,8 @@ std::int32_t firstSourceFrame(const EventBase& event, const Framerate& framerate
 } // namespace
 
 EventPicture::EventPicture(const EventList& events, std::size_t index, const PictureRules& rules, TextNumbers& numbers)
-    : m_event(static_cast<std::int32_t>(index))
+    : m_event(static_cast<std::int32_t>(index)),
+      m_name(numbers.numberOf(materialText("name", {plainNameOf(events.at(index), rules)})))
 {
     const EventBase& event = events.at(index);
     const std::string& name = nameBy(rules.matchBy, event);
@@ -92,6 +98,7 @@ ShownRun EventPicture::runFrom(std::int32_t from) const
             .length = 0,
             .material = material.number,
             .version = material.version,
+            .name = m_name,
             .source = material.source + from * material.sourceStep,
             .sourceStep = material.sourceStep,
             .event = m_event,

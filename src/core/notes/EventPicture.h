@@ -27,6 +27,7 @@ private:
     };
 
     std::int32_t m_event;
+    std::int32_t m_name; ///< without its version
     Material m_body;
     std::optional<Material> m_transition;
     std::int32_t m_transitionLength = 0;

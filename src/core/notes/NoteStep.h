@@ -77,7 +77,7 @@ struct NoteStep {
     std::int32_t moved = 0;             ///< frames
     std::vector<WorkPlace> doubledFrom; ///< of each change of the kind Doubled, where the picture is as well
     std::vector<PictureChange> changes; ///< at least one
-    std::size_t joined = 1;             ///< of so many steps this one is made
+    std::size_t joined = 1;             ///< of so many steps this one is made, new versions not counted
 
     /// What the reel of `place` wins or loses where it is no move within the reel.
     std::int32_t lengthChange() const { return action == StepAction::Replace ? inserted.length - removed : 0; }

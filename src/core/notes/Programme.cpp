@@ -131,7 +131,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
         if (m_reels.empty() || gap >= gapBetweenReels)
             m_reels.push_back({stretch.in, length(), 0});
         else if (gap > 0)
-            append({0, 0, gapMaterial, gapMaterial, 0.0, 1.0, ShownRun::NoEvent, false}, gap);
+            append({0, 0, gapMaterial, gapMaterial, gapMaterial, 0.0, 1.0, ShownRun::NoEvent, false}, gap);
         const EventBase& event = events.at(static_cast<std::size_t>(stretch.event));
         const EventPicture picture(events, static_cast<std::size_t>(stretch.event), rules, numbers);
         const std::int32_t dstIn = event.dstIn().toFrameCount(rules.framerate);

@@ -26,6 +26,7 @@ struct ShownRun {
     std::int32_t length;   ///< in frames, at least 1
     std::int32_t material; ///< numbered for both programmes; freezes, transitions and flawed events are materials too
     std::int32_t version;  ///< equal for equal names with their VFX versions
+    std::int32_t name;     ///< equal for equal names without them, at whatever speed and in which direction it plays
     double source;
     double sourceStep;
     std::int32_t event; ///< place in the list, or NoEvent for a gap

@@ -19,9 +19,8 @@ struct ShotPiece {
     std::int32_t event = ShownRun::NoEvent;
     FrameSpan frames;
     bool hasTransition = false;
-    double source = 0.0;
-    double sourceStep = 1.0;
-    bool isTold = false; ///< as a part of another change
+    std::int32_t name = 0; ///< that of its run
+    bool isTold = false;   ///< as a part of another change
 };
 
 std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameSpan& frames)
@@ -39,7 +38,7 @@ std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameSpan& fra
             pieces.back().frames.length += length;
             pieces.back().hasTransition |= run.isTransition;
         } else {
-            pieces.push_back({run.event, {start, length}, run.isTransition, run.source, run.sourceStep});
+            pieces.push_back({run.event, {start, length}, run.isTransition, run.name});
         }
     }
     return pieces;
@@ -265,7 +264,7 @@ private:
         const EventBase* const oldShot = shotOf(m_oldCut, oldPiece.event);
         const EventBase* const newShot = shotOf(m_newCut, newPiece.event);
         return oldShot != nullptr && newShot != nullptr && oldShot->isValid() && newShot->isValid() &&
-               oldShot->rollName() == newShot->rollName() &&
+               oldPiece.name == newPiece.name &&
                !EventBase::areSameSpeed(oldShot->signedSpeed(), newShot->signedSpeed()) &&
                (oldShot->srcIn() < newShot->srcOut() || oldShot->srcIn() == newShot->srcIn()) &&
                (newShot->srcIn() < oldShot->srcOut() || oldShot->srcIn() == newShot->srcIn());
@@ -391,9 +390,22 @@ PictureChange StepChanges::ofMoving(FrameSpan inOld, FrameSpan inNew) const
     return ofKept(ChangeKind::Moved, inOld, inNew);
 }
 
-PictureChange StepChanges::ofUnchanged(const KeptStretch& kept) const
+std::vector<PictureChange> StepChanges::ofReplacedByItself(const KeptStretch& kept) const
 {
-    return ofKept(ChangeKind::Unchanged, {kept.oldStart, kept.length}, {kept.newStart, kept.length});
+    std::vector<PictureChange> changes;
+    const std::int32_t shift = kept.oldStart - kept.newStart;
+    std::int32_t frame = kept.newStart;
+    const auto addUnchangedUpTo = [&](std::int32_t end) {
+        if (frame < end)
+            changes.push_back(ofKept(ChangeKind::Unchanged, {frame + shift, end - frame}, {frame, end - frame}));
+    };
+    for (const PictureChange& version : ofVersions(kept)) {
+        addUnchangedUpTo(version.inNew->start);
+        frame = version.inNew->end();
+        changes.push_back(version);
+    }
+    addUnchangedUpTo(kept.newEnd());
+    return changes;
 }
 
 PictureChange StepChanges::ofKept(ChangeKind kind, FrameSpan inOld, FrameSpan inNew) const

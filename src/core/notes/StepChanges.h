@@ -27,8 +27,8 @@ public:
     std::vector<PictureChange> ofReplacing(const NoteStep& step, const StepSurroundings& around,
                                            const std::vector<KeptStretch>& doubled) const;
     PictureChange ofMoving(FrameSpan inOld, FrameSpan inNew) const;
-    /// Of kept picture that a step takes out and puts back.
-    PictureChange ofUnchanged(const KeptStretch& kept) const;
+    /// Of kept picture that a step takes out and puts back, part of it perhaps as another version.
+    std::vector<PictureChange> ofReplacedByItself(const KeptStretch& kept) const;
     /// A change for each shot of a kept stretch that bears another version than before.
     std::vector<PictureChange> ofVersions(const KeptStretch& kept) const;
 

@@ -25,7 +25,8 @@ void extendOver(NoteStep& step, const KeptStretch& kept, const StepChanges& chan
     step.inserted.start = step.inserted.length == 0 ? kept.newStart : step.inserted.start;
     step.inserted.length = kept.newEnd() - step.inserted.start;
     step.removedFrames.push_back({kept.oldStart, kept.length});
-    step.changes.push_back(changes.ofUnchanged(kept));
+    const std::vector<PictureChange> between = changes.ofReplacedByItself(kept);
+    step.changes.insert(step.changes.end(), between.begin(), between.end());
 }
 
 void extendOver(NoteStep& step, const NoteStep& next)
@@ -35,6 +36,18 @@ void extendOver(NoteStep& step, const NoteStep& next)
     step.removedFrames.insert(step.removedFrames.end(), next.removedFrames.begin(), next.removedFrames.end());
     step.changes.insert(step.changes.end(), next.changes.begin(), next.changes.end());
     step.joined += next.joined;
+}
+
+/// The first row from `row` on that is no new version of the shots before it, or the number of rows.
+std::size_t nextAfterVersions(const std::vector<NoteRow>& rows, std::size_t row)
+{
+    const auto isVersion = [](const NoteRow& each) {
+        const auto* const step = std::get_if<NoteStep>(&each);
+        return step != nullptr && step->action == StepAction::Relabel;
+    };
+    while (row < rows.size() && isVersion(rows[row]))
+        ++row;
+    return row;
 }
 
 /// The place after the last of the rows from `first` on that make one step together, which goes to `joined`; `first` when
@@ -48,9 +61,10 @@ std::size_t joinFrom(const std::vector<NoteRow>& rows, std::size_t first, std::i
     NoteStep step = *begin;
     std::int32_t between = 0;
     std::size_t end = first;
-    for (std::size_t row = first + 1; row + 1 < rows.size(); row += 2) {
+    for (std::size_t row = first + 1; row < rows.size(); ++row) {
         const auto* const kept = std::get_if<KeptStretch>(&rows[row]);
-        const auto* const next = std::get_if<NoteStep>(&rows[row + 1]);
+        row = nextAfterVersions(rows, row + 1);
+        const auto* const next = row < rows.size() ? std::get_if<NoteStep>(&rows[row]) : nullptr;
         if (kept == nullptr || next == nullptr || !isTrim(*next))
             break;
         between += kept->length;
@@ -59,7 +73,7 @@ std::size_t joinFrom(const std::vector<NoteRow>& rows, std::size_t first, std::i
         extendOver(step, *kept, changes);
         extendOver(step, *next);
         if (step.lengthChange() == 0) {
-            end = row + 2;
+            end = row + 1;
             joined = step;
             break;
         }

@@ -210,13 +210,14 @@ void NotesReplay::lookAtChanges(const json& step)
         lookAtChange(change, step);
         const std::string kind = change.at("kind");
         const int frames = intOf(change, "frames");
+        const bool isInPlace = kind == "replaced" || kind == "unchanged" || kind == "version-changed";
         if (kind == "head-trimmed" || kind == "tail-trimmed") {
             lost += std::max(0, -frames);
             won += std::max(0, frames);
-        } else if (kind == "lifted" || kind == "replaced" || kind == "unchanged") {
+        } else if (kind == "lifted" || isInPlace) {
             lost += frames;
         }
-        if (kind == "inserted" || kind == "replaced" || kind == "doubled" || kind == "unchanged")
+        if (kind == "inserted" || kind == "doubled" || isInPlace)
             won += frames;
         // A shot that is retimed, or a transition, changes frames without a loss of its own.
         isSimple = isSimple && kind != "retimed" && !kind.starts_with("transition");

@@ -8,6 +8,7 @@
 #include <cmath>
 #include <cstdlib>
 #include <initializer_list>
+#include <set>
 
 namespace cadrel::tests {
 
@@ -408,6 +409,29 @@ bool goesOn(const json& step, std::size_t reel)
     return at.at("reel") != number || (from.at("reel") == number && from.at("frame") < at.at("frame"));
 }
 
+/// The change that stands for a step: the first of the longest.
+const json& largestOf(const json& step)
+{
+    const auto extentOf = [](const json& change) {
+        return change.at("kind") == "unchanged" ? 0 : std::abs(change.at("frames").get<int>());
+    };
+    const json* largest = &step.at("changes")[0];
+    for (const json& change : step.at("changes"))
+        largest = extentOf(change) > extentOf(*largest) ? &change : largest;
+    return *largest;
+}
+
+/// The shot of a change, as each cut that has it writes it. What is replaced is another shot.
+std::set<json> shotsIn(const json& change)
+{
+    std::set<json> shots;
+    if (change.contains("newShot"))
+        shots.insert(json{"new", change.at("newShot")});
+    if (change.contains("oldShot") && (shots.empty() || change.at("kind") != "replaced"))
+        shots.insert(json{"old", change.at("oldShot")});
+    return shots;
+}
+
 } // namespace
 
 std::string PrintedNotes::placeOf(const json& row, std::size_t reel) const
@@ -484,14 +508,19 @@ std::string PrintedNotes::rowOf(const json& row, std::size_t reel, int offset, F
 
 std::string PrintedNotes::shotsOf(const json& step) const
 {
-    const json& changes = step.at("changes");
-    const auto extentOf = [](const json& change) {
-        return change.at("kind") == "unchanged" ? 0 : std::abs(change.at("frames").get<int>());
-    };
-    const json* largest = &changes[0];
-    for (const json& change : changes)
-        largest = extentOf(change) > extentOf(*largest) ? &change : largest;
-    return withMore(wordsOf(*largest).shot, changes.size() - 1);
+    const json& largest = largestOf(step);
+    std::set<json> told = shotsIn(largest);
+    std::size_t more = 0;
+    for (const json& change : step.at("changes")) {
+        const std::set<json> shots = shotsIn(change);
+        const bool isTold =
+            change.at("kind") == "unchanged" || shots.empty() ||
+            std::any_of(shots.begin(), shots.end(), [&](const json& shot) { return told.contains(shot); });
+        more += isTold ? 0 : 1;
+        if (change.at("kind") != "unchanged")
+            told.insert(shots.begin(), shots.end());
+    }
+    return withMore(wordsOf(largest).shot, more);
 }
 
 std::string PrintedNotes::largest(Form form) const
@@ -725,14 +754,14 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
     const int removed = step.at("deleteFrames");
     const int inserted = step.at("insertFrames");
     const auto time = [](int frames) { return frames == 0 ? "" : timecodeOfFrames(frames); };
-    const json& first = step.at("changes")[0];
-    const auto placeIn = [&first](const char* side) {
-        return first.contains(side) ? first.at(side).at("in").get<std::string>() : "";
+    const json& largest = largestOf(step);
+    const auto placeIn = [&largest](const char* side) {
+        return largest.contains(side) ? largest.at(side).at("in").get<std::string>() : "";
     };
     const json none{{"roll", ""}, {"clip", ""}};
-    const json& shot = first.contains("newShot")   ? first.at("newShot")
-                       : first.contains("oldShot") ? first.at("oldShot")
-                                                   : none;
+    const json& shot = largest.contains("newShot")   ? largest.at("newShot")
+                       : largest.contains("oldShot") ? largest.at("oldShot")
+                                                     : none;
     std::string kinds;
     std::string changes;
     for (const json& change : step.at("changes")) {
@@ -759,7 +788,11 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
                                          placeIn("new"),
                                          changes,
                                          feet(step.at("at").at("frame")),
-                                         isMove ? feet(step.at("from").at("frame")) : ""};
+                                         isMove ? feet(step.at("from").at("frame")) : "",
+                                         std::to_string(step.at("at").at("reel").get<int>()),
+                                         isMove ? std::to_string(step.at("from").at("reel").get<int>()) : "",
+                                         m_notes.at("rate"),
+                                         largest.value("sourceIn", "")};
     std::string row;
     for (const std::string& cell : cells)
         row += (row.empty() ? "" : ",") + inQuotes(cell);

@@ -28,12 +28,14 @@ struct Shot {
     int length = 0;
     int srcLength = -1; ///< -1: the length
     int dissolve = 0;   ///< frames
+    std::string clip = {};
 };
 
 std::shared_ptr<EventBase> eventOf(const Shot& shot, int dstIn, unsigned number)
 {
     auto event = std::make_shared<EventBase>();
     event->setRollName(shot.roll);
+    event->setClipName(shot.clip);
     event->setEventNumber(number);
     const int srcLength = shot.srcLength < 0 ? shot.length : shot.srcLength;
     event->setTimecodes(Timecode(shot.srcIn), Timecode(shot.srcIn + srcLength), Timecode(dstIn),
@@ -64,7 +66,12 @@ std::string rollOf(std::size_t number)
 class Notes {
 public:
     Notes(EventList oldList, EventList newList, int simplify = 0, const std::string& vfxPrefix = {})
-        : oldCut(std::move(oldList)), newCut(std::move(newList)), notes(oldCut, newCut, rulesOf(vfxPrefix), simplify)
+        : Notes(std::move(oldList), std::move(newList), rulesOf(vfxPrefix), simplify)
+    {
+    }
+
+    Notes(EventList oldList, EventList newList, const PictureRules& rules, int simplify = 0)
+        : oldCut(std::move(oldList)), newCut(std::move(newList)), notes(oldCut, newCut, rules, simplify)
     {
     }
 
@@ -262,6 +269,44 @@ TEST_F(ChangeNotesTest, AnotherSpeedIsARetime)
     EXPECT_EQ(textOf(film.steps()), Texts{"-50 +25 at 100: retimed 25;"});
 }
 
+PictureRules byClip()
+{
+    return {Framerate(25, 0), MatchBy::ClipName, {}};
+}
+
+TEST_F(ChangeNotesTest, AnotherClipOfTheSameRollAtAnotherSpeedIsALiftAndAnInsertWhereClipsAreMatched)
+{
+    const EventList oldCut =
+        reelOf({{"AX", 0, 100, -1, 0, "ONE"}, {"AX", 500, 50, -1, 0, "TWO"}, {"AX", 900, 10, -1, 0, "END"}});
+    const EventList newCut =
+        reelOf({{"AX", 0, 100, -1, 0, "ONE"}, {"AX", 500, 25, 50, 0, "NEW"}, {"AX", 900, 10, -1, 0, "END"}});
+    const Notes film(oldCut, newCut, byClip());
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-50 +25 at 100: lifted 50; inserted 25;"});
+    EXPECT_EQ(textOf(Notes(oldCut, newCut).steps()), Texts{"-50 +25 at 100: retimed 25;"});
+}
+
+TEST_F(ChangeNotesTest, TheSameClipOfAnotherRollAtAnotherSpeedIsARetimeWhereClipsAreMatched)
+{
+    const EventList oldCut =
+        reelOf({{"R1", 0, 100, -1, 0, "ONE"}, {"R2", 0, 50, -1, 0, "TWO"}, {"R3", 0, 10, -1, 0, "END"}});
+    const EventList newCut =
+        reelOf({{"R1", 0, 100, -1, 0, "ONE"}, {"R9", 0, 25, 50, 0, "TWO"}, {"R3", 0, 10, -1, 0, "END"}});
+    const Notes film(oldCut, newCut, byClip());
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-50 +25 at 100: retimed 25;"});
+    EXPECT_EQ(textOf(Notes(oldCut, newCut).steps()), Texts{"-50 +25 at 100: lifted 50; inserted 25;"});
+}
+
+TEST_F(ChangeNotesTest, AnotherSpeedOfANewVersionIsARetime)
+{
+    const EventList oldCut = reelOf({{"A", 0, 100}, {"VFX_1", 0, 50}, {"C", 0, 10}});
+    const EventList newCut = reelOf({{"A", 0, 100}, {"VFX_2", 0, 25, 50}, {"C", 0, 10}});
+
+    EXPECT_EQ(textOf(Notes(oldCut, newCut, 0, "VFX_").steps()), Texts{"-50 +25 at 100: retimed 25;"});
+    EXPECT_EQ(textOf(Notes(oldCut, newCut).steps()), Texts{"-50 +25 at 100: lifted 50; inserted 25;"});
+}
+
 /// The reel with one of its shots played backwards.
 EventList withReversed(EventList reel, std::size_t shot)
 {
@@ -388,6 +433,88 @@ TEST_F(ChangeNotesTest, TrimsThatCancelOutWithinSoManyFramesAreOneStep)
     const Notes film(oldCut, newCut, 40);
     EXPECT_EQ(textOf(film.steps()), Texts{"-45 +45 at 95: tail -5; unchanged 40; head 5;"});
     EXPECT_EQ(film.notes.joinedSteps(), 2U);
+}
+
+TEST_F(ChangeNotesTest, TrimsAroundANewVersionAreOneStepThatTellsTheVersion)
+{
+    const EventList oldCut = reelOf({{"A", 0, 100}, {"VFX_1", 0, 40}, {"C", 10, 50}});
+    const EventList newCut = reelOf({{"A", 0, 95}, {"VFX_2", 0, 40}, {"C", 5, 55}});
+
+    EXPECT_EQ(Notes(oldCut, newCut, 39, "VFX_").steps().size(), 3U);
+    const Notes film(oldCut, newCut, 40, "VFX_");
+    EXPECT_EQ(textOf(film.steps()), Texts{"-45 +45 at 95: tail -5; version 40; head 5;"});
+    EXPECT_EQ(film.notes.joinedSteps(), 2U);
+    EXPECT_EQ(film.steps()[0].changes[1].inOld, (FrameSpan{100, 40}));
+    EXPECT_EQ(film.steps()[0].changes[1].inNew, (FrameSpan{95, 40}));
+}
+
+TEST_F(ChangeNotesTest, AJoinedStepTellsUnchangedShotsAroundANewVersion)
+{
+    const Notes film(
+        reelOf({{"A", 0, 100}, {"B", 0, 20}, {"VFX_1", 0, 40}, {"D", 0, 8}, {"VFX_3", 90, 7}, {"C", 10, 50}}),
+        reelOf({{"A", 0, 95}, {"B", 0, 20}, {"VFX_2", 0, 40}, {"D", 0, 8}, {"VFX_4", 90, 7}, {"C", 5, 55}}), 75,
+        "VFX_");
+
+    EXPECT_EQ(textOf(film.steps()),
+              Texts{"-80 +80 at 95: tail -5; unchanged 20; version 40; unchanged 8; version 7; head 5;"});
+    EXPECT_EQ(film.steps()[0].changes[3].inOld, (FrameSpan{160, 8}));
+    EXPECT_EQ(film.steps()[0].changes[3].inNew, (FrameSpan{155, 8}));
+}
+
+TEST_F(ChangeNotesTest, ANewVersionAfterTheLastOfTheTrimsStaysAStep)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 40}, {"VFX_1", 10, 50}}),
+                     reelOf({{"A", 0, 95}, {"B", 0, 40}, {"VFX_2", 5, 55}}), 40, "VFX_");
+
+    EXPECT_EQ(textOf(film.steps()),
+              (Texts{"-45 +45 at 95: tail -5; unchanged 40; head 5;", "50 again at 140: version 50;"}));
+}
+
+/// How many shots the step changes besides that of its change number `named`.
+std::size_t othersOf(const NoteStep& step, std::size_t named)
+{
+    return otherShots(step, step.changes.at(named));
+}
+
+TEST_F(ChangeNotesTest, UnchangedShotsDontCountAsChanged)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 40}, {"C", 10, 50}}),
+                     reelOf({{"A", 0, 95}, {"B", 0, 40}, {"C", 5, 55}}), 40);
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"-45 +45 at 95: tail -5; unchanged 40; head 5;"});
+    EXPECT_EQ(othersOf(film.steps()[0], 0), 1U);
+    EXPECT_EQ(othersOf(film.steps()[0], 2), 1U);
+}
+
+TEST_F(ChangeNotesTest, AShotThatWinsATransitionAndFramesIsOneShot)
+{
+    // The dissolve into B lies 6 frames on both sides of the old cut, and B begins 10 frames earlier than for it alone.
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 20, 50}}), reelOf({{"A", 0, 94}, {"B", 4, 66, -1, 12}}));
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"-6 +16 at 94: transition in 12; head 10;"});
+    EXPECT_EQ(othersOf(film.steps()[0], 0), 0U);
+    EXPECT_EQ(othersOf(film.steps()[0], 1), 0U);
+}
+
+TEST_F(ChangeNotesTest, AGapIsNoShot)
+{
+    EventList oldCut = reelOf({{"A", 0, 100}});
+    oldCut.append(reelOf({{"B", 0, 50}}, Hour + 110));
+    const Notes film(oldCut, reelOf({{"A", 0, 100}, {"B", 5, 45}}));
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"-15 +0 at 100: lifted 10; head -5;"});
+    EXPECT_EQ(othersOf(film.steps()[0], 0), 1U);
+    EXPECT_EQ(othersOf(film.steps()[0], 1), 0U);
+}
+
+TEST_F(ChangeNotesTest, ShotsThatGoAndShotsThatComeAreCountedEach)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 20}, {"D", 0, 10}}),
+                     reelOf({{"A", 0, 100}, {"X", 0, 51}, {"D", 0, 10}}));
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"-70 +51 at 100: lifted 50; lifted 20; inserted 51;"});
+    for (const std::size_t named : {0U, 1U, 2U})
+        EXPECT_EQ(othersOf(film.steps()[0], named), 2U);
 }
 
 TEST_F(ChangeNotesTest, AJoinedStepNamesWhatItReplacesByItself)
