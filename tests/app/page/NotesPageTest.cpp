@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/app/Film.h"
+#include "tests/app/NotesOfCuts.h"
 #include "tests/app/ProgramRun.h"
 #include "tests/app/page/Browser.h"
 #include "tests/support/TreePaths.h"
@@ -475,9 +476,10 @@ TEST_F(NotesPage, TheWheelZoomsWithControlAlone)
 {
     const double whole = wholeWidth();
 
-    browser.turnWheel(600, 350, -100, true);
+    const int middle = browser.valueOf("Math.round((b => b.top + b.height / 2)(svg.getBoundingClientRect()))");
+    browser.turnWheel(600, middle, -100, true);
     EXPECT_NEAR(shownWidth(), whole * 0.8, 1e-6 * whole);
-    browser.turnWheel(600, 350, 100, false);
+    browser.turnWheel(600, middle, 100, false);
     EXPECT_NEAR(shownWidth(), whole * 0.8, 1e-6 * whole);
 }
 
@@ -568,7 +570,10 @@ TEST_F(NotesPage, TheMarksOfAKindThatIsLeftOutAreGoneWhereTheirLineStays)
 
     // Steps that are of another kind, too, keep their lines.
     EXPECT_EQ(count(shownMarks), 0);
-    EXPECT_EQ(count("shownRows('lifted')"), 5);
+    const int ofSeveralKinds = count("all('tr[id]').map(row => row.dataset.kinds.split(' '))"
+                                     ".filter(kinds => kinds.includes('lifted') && new Set(kinds).size > 1).length");
+    EXPECT_GT(ofSeveralKinds, 0);
+    EXPECT_EQ(count("shownRows('lifted')"), ofSeveralKinds);
     EXPECT_EQ(browser.valueOf("document.querySelector('.left').textContent"),
               "Left out: lines that are only lifted, and that colour in the picture. 58 of 62 steps are shown.");
 }
@@ -619,7 +624,7 @@ TEST_F(NotesPage, SaysOnPaperWhatIsLeftOut)
     browser.valueOf("boxes.forEach(box => { box.checked = box.value === 'moved'; });"
                     "boxes[0].dispatchEvent(new Event('change'))");
 
-    const std::string paper = textOnPaper(browser, *s_folder);
+    const std::string paper = unbroken(textOnPaper(browser, *s_folder));
 
     EXPECT_NE(paper.find("Left out: lines that are only kept, trimmed, "), std::string::npos) << paper;
     EXPECT_NE(paper.find("and those colours in the picture. 2 of 62 steps are shown."), std::string::npos) << paper;
