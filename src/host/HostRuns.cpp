@@ -16,6 +16,7 @@
 #include "host/undo/PreviewEventsStep.h"
 #include "host/video/ProjectVideo.h"
 #include "host/video/VideoWriting.h"
+#include "util/FilledText.h"
 #include "util/StringUtil.h"
 #include "velmark/UserInterface.h"
 
@@ -30,6 +31,12 @@ using Action = cadrel::core::ActionChangeContext;
 namespace cadrel::host {
 
 namespace {
+
+// What becomes of material for which the project has no room at its beginning.
+constexpr const wchar_t* LeftOutOfOne =
+    L"Left out, as it would stand before the project or its day begins: material of event %s.";
+constexpr const wchar_t* LeftOutOfMany =
+    L"Left out, as it would stand before the project or its day begins: material of %s events, first of event %s.";
 
 bool isOnlySelected(const core::Settings& settings)
 {
@@ -302,10 +309,11 @@ void Host::tellOfLeftOut(const Project& project)
     if (events.empty())
         return;
     const std::wstring first = std::to_wstring(events.front());
-    const std::wstring whose =
-        events.size() == 1 ? L"event " + first
-                           : std::to_wstring(events.size()) + L" events, the first of them event " + first + L",";
-    showAlert(L"Material of " + whose + L" would stand before the project or its day begins. It has been left out.");
+    if (events.size() == 1)
+        showAlert(util::filled(util::StringUtil::translate(LeftOutOfOne), first));
+    else
+        showAlert(util::filled(util::filled(util::StringUtil::translate(LeftOutOfMany), std::to_wstring(events.size())),
+                               first));
 }
 
 Result::Type Host::withProgress(Project& project, const Appearance& appearance, std::size_t eventCount,

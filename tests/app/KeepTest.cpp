@@ -344,7 +344,7 @@ TEST(Keep, TellsOfSoundThatWouldStandBeforeTheProjectBegins)
     const Outcome cut = Job(threeShots(), earlier, sound(0), Hour).run();
     EXPECT_EQ(cut.status, 0) << cut.err;
     EXPECT_TRUE(
-        tells(cut.err, "Material of event 1 would stand before the project or its day begins. It has been left out."))
+        tells(cut.err, "Left out, as it would stand before the project or its day begins: material of event 1."))
         << cut.err;
 
     const Outcome whole = Job(threeShots(), earlier, sound(4), Hour - 4).run();

@@ -1077,7 +1077,7 @@ TEST_P(HostPreviewTest, TellsWhatWouldStandBeforeTheProjectBegins)
 
     previewAll();
 
-    const Entries told{u"Material of event 2 would stand before the project or its day begins. It has been left out."};
+    const Entries told{u"Left out, as it would stand before the project or its day begins: material of event 2."};
     EXPECT_EQ(host.alerts->messages, told);
 }
 

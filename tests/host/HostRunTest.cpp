@@ -865,8 +865,7 @@ TEST_P(HostRunTest, TellsWhatWouldStandBeforeTheProjectBegins)
 
         host.conform();
 
-        const Entries told{
-            u"Material of event 2 would stand before the project or its day begins. It has been left out."};
+        const Entries told{u"Left out, as it would stand before the project or its day begins: material of event 2."};
         EXPECT_EQ(host.alerts->messages, at.isTold ? told : Entries());
         EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
         ASSERT_TRUE(host.undo());
@@ -886,8 +885,7 @@ TEST_P(HostRunTest, TellsOfHowManyEventsSomethingWouldStandBeforeTheProjectBegin
 
     host.conform();
     const Entries told{
-        u"Material of 2 events, the first of them event 2, would stand before the project or its day begins. "
-        u"It has been left out."};
+        u"Left out, as it would stand before the project or its day begins: material of 2 events, first of event 2."};
     EXPECT_EQ(host.alerts->messages, told);
 
     ASSERT_TRUE(host.undo());

@@ -93,7 +93,7 @@ protected:
         const auto& open = m_application.views().windows();
         return open.empty() ? nullptr : open.front().get();
     }
-    bool isDrawn() { return m_windows.colourAt(400, 400) == Band; }
+    bool isDrawn() { return m_windows.colourAt(400, 425) == Band; }
 
     /// What the user has been told, a line each, and was not asked for before.
     std::string messages()

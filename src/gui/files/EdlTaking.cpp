@@ -3,9 +3,9 @@
 #include "gui/files/EdlTaking.h"
 
 #include "gui/files/EdlFile.h"
-#include "gui/files/FilledText.h"
 #include "gui/files/TakenFiles.h"
 #include "gui/services/AlertWindowBase.h"
+#include "util/FilledText.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 #include "util/Utf8Text.h"
@@ -31,7 +31,7 @@ void tell(const std::wstring& message)
 
 std::wstring about(const std::wstring& sentence, const std::string& path)
 {
-    return filled(StringUtil::translate(sentence), util::toShownLine(path));
+    return util::filled(StringUtil::translate(sentence), util::toShownLine(path));
 }
 
 std::unique_ptr<EdlFile> readEdl(const std::string& path, std::int32_t listKind, bool renameBRolls)

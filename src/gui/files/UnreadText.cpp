@@ -2,7 +2,7 @@
 
 #include "gui/files/UnreadText.h"
 
-#include "gui/files/FilledText.h"
+#include "util/FilledText.h"
 #include "util/StringUtil.h"
 #include "util/Utf8Text.h"
 
@@ -65,7 +65,7 @@ std::wstring textOfUnread(const std::vector<UnreadLine>& lines, std::size_t most
     for (std::size_t index = 0; index < told; ++index)
         text += textOf(lines[index]) + L"\n";
     if (told < lines.size())
-        text += filled(StringUtil::translate(L"and %s more"), std::to_wstring(lines.size() - told)) + L"\n";
+        text += util::filled(StringUtil::translate(L"and %s more"), std::to_wstring(lines.size() - told)) + L"\n";
     return text;
 }
 

@@ -5,9 +5,9 @@
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/model/DataModelCommandCreator.h"
-#include "gui/files/FilledText.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ShownText.h"
+#include "util/FilledText.h"
 #include "util/Result.h"
 #include "util/Utf8Text.h"
 
@@ -59,9 +59,9 @@ std::wstring failureText(Result::Type result)
 
 std::wstring passedOverText(std::size_t count, const GenerationFailure& first)
 {
-    return filled(translated(L"Events that can't be matched, since a timecode would lie outside of the day: %s"),
-                  std::to_wstring(count)) +
-           L"\n" + filled(translated(L"The first is event %s."), eventText(first));
+    return util::filled(translated(L"Events that can't be matched, since a timecode would lie outside of the day: %s"),
+                        std::to_wstring(count)) +
+           L"\n" + util::filled(translated(L"The first is event %s."), eventText(first));
 }
 
 } // namespace

@@ -4,8 +4,8 @@
 
 #include "core/protect/ProtectedRun.h"
 #include "core/time/Timecode.h"
-#include "gui/files/FilledText.h"
 #include "gui/look/ShownText.h"
+#include "util/FilledText.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
@@ -30,7 +30,7 @@ std::wstring lengthText(const FrameRanges& ranges, const core::Framerate& framer
 
 std::wstring amountText(const wchar_t* sentence, const FrameRanges& ranges, const core::Framerate& framerate)
 {
-    return filled(translated(sentence), lengthText(ranges, framerate));
+    return util::filled(translated(sentence), lengthText(ranges, framerate));
 }
 
 } // namespace

@@ -5,9 +5,9 @@
 #include "core/edl/EventList.h"
 #include "core/fileio/CmxWriter.h"
 #include "core/time/Timecode.h"
-#include "gui/files/FilledText.h"
 #include "gui/look/ShownText.h"
 #include "util/FilePath.h"
+#include "util/FilledText.h"
 #include "util/StringUtil.h"
 
 #include <algorithm>
@@ -59,7 +59,7 @@ std::wstring SavedChangeEdl::question() const
     for (std::size_t index = 0; index < std::min(files.size(), MostNamed); ++index)
         text += L"\n" + nameOf(files[index]);
     if (files.size() > MostNamed)
-        text += L"\n" + filled(translated(L"and %s more"), std::to_wstring(files.size() - MostNamed));
+        text += L"\n" + util::filled(translated(L"and %s more"), std::to_wstring(files.size() - MostNamed));
     return text;
 }
 

@@ -489,10 +489,10 @@ bool MemoSync::isFollowed(const HostEvent& copy)
 std::vector<PreviewRecord::Node> MemoSync::othersThan(const PreviewRecord& record,
                                                       std::vector<PreviewRecord::Node> events)
 {
-    const auto firstEdited = std::ranges::stable_partition(events, [](const PreviewRecord::Node& event) {
-                                 const auto mark = MemoMark::keptBy(*event);
-                                 return !mark || *mark == MemoMark::of(*event);
-                             }).begin();
+    const auto firstEdited = std::stable_partition(events.begin(), events.end(), [](const PreviewRecord::Node& event) {
+        const auto mark = MemoMark::keptBy(*event);
+        return !mark || *mark == MemoMark::of(*event);
+    });
     const std::vector<PreviewRecord::Node> edited(firstEdited, events.end());
     events.erase(firstEdited, events.end());
     events = record.others(std::move(events));

@@ -486,7 +486,7 @@ TEST_F(CadrelTest, IsUnmappedAsAModuleOfAHostWithAJuceOfItsOwn)
         const standin::ModuleLoader loader(m_application, module, m_bundle);
         ASSERT_TRUE(isMapped("Cadrel.so"));
         ASSERT_TRUE(m_application.choose(m_application.menus().commands().front()));
-        ASSERT_TRUE(turnUntil([this] { return m_windows.colourAt(400, 400) == Band; }));
+        ASSERT_TRUE(turnUntil([this] { return m_windows.colourAt(400, 425) == Band; }));
     };
     // What the first round opens for good, fonts for one, is the system's.
     loadAndUnload();

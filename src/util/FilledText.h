@@ -4,7 +4,7 @@
 
 #include <string>
 
-namespace cadrel::gui {
+namespace cadrel::util {
 
 /// The sentence with the value in place of its "%s".
 inline std::wstring filled(std::wstring sentence, const std::wstring& value)
@@ -13,4 +13,4 @@ inline std::wstring filled(std::wstring sentence, const std::wstring& value)
     return place == std::wstring::npos ? sentence : sentence.replace(place, 2, value);
 }
 
-} // namespace cadrel::gui
+} // namespace cadrel::util
