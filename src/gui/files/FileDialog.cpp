@@ -5,6 +5,7 @@
 #include "core/model/DataModel.h"
 #include "gui/files/EdlFolder.h"
 #include "gui/files/EdlTaking.h"
+#include "gui/files/FilePaths.h"
 #include "gui/files/TakenFiles.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ButtonTile.h"
@@ -45,14 +46,6 @@ std::wstring titleFor(std::int32_t listType)
     default:
         return L"Add EDL to Change EDL List";
     }
-}
-
-std::vector<std::string> pathsOf(const juce::StringArray& files)
-{
-    std::vector<std::string> paths;
-    for (const juce::String& file : files)
-        paths.push_back(file.toStdString());
-    return paths;
 }
 
 } // namespace

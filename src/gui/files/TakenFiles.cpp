@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/model/DataModelCommandCreator.h"
+#include "core/model/ListOfKind.h"
 #include "gui/files/EdlFile.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
@@ -68,20 +69,6 @@ std::wstring indented(const std::wstring& lines)
         start = end;
     }
     return text;
-}
-
-EventList& listOf(DataModel& model, std::int32_t listKind)
-{
-    switch (listKind) {
-    case ListKind::Old:
-        return model.oldEdl();
-    case ListKind::New:
-        return model.newEdl();
-    case ListKind::Change:
-        return model.changeEdl();
-    default:
-        throw Result::InvalidArgument;
-    }
 }
 
 std::wstring undoNameOf(std::int32_t listKind)
@@ -180,7 +167,7 @@ std::vector<std::shared_ptr<core::EventBase>> TakenFiles::shiftedEvents(const Ed
 void TakenFiles::appendTo(DataModel& model, const EdlOffset& destination, const EdlOffset& source,
                           const std::wstring& folder) const
 {
-    EventList& target = listOf(model, m_listKind);
+    EventList& target = core::listOf(model, m_listKind);
     // All of it or nothing: what can fail comes first.
     const core::Variant storedFolder(StringUtil::toUtf8(folder));
     std::vector<std::shared_ptr<core::EventBase>> events = shiftedEvents(destination, source);

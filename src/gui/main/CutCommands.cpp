@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/model/DataModelCommandCreator.h"
+#include "core/model/ListOfKind.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ShownText.h"
 #include "util/FilledText.h"
@@ -66,23 +67,9 @@ std::wstring passedOverText(std::size_t count, const GenerationFailure& first)
 
 } // namespace
 
-EventList& CutCommands::listOf(DataModel& model, std::int32_t listKind)
-{
-    switch (listKind) {
-    case ListKind::Old:
-        return model.oldEdl();
-    case ListKind::New:
-        return model.newEdl();
-    case ListKind::Change:
-        return model.changeEdl();
-    default:
-        throw Result::InvalidArgument;
-    }
-}
-
 void CutCommands::clear(DataModel& model, std::int32_t listKind)
 {
-    EventList& list = listOf(model, listKind);
+    EventList& list = core::listOf(model, listKind);
     const auto command = core::createDataModelCommand(translated(nameOfClearing(listKind)));
     list.clear();
 }

@@ -16,9 +16,6 @@ namespace cadrel::gui {
 /// ended before.
 namespace CutCommands {
 
-/// The list of that kind (core::ListKind).
-core::EventList& listOf(core::DataModel& model, std::int32_t listKind);
-
 void clear(core::DataModel& model, std::int32_t listKind);
 /// Makes the change EDL of the two cuts. Events that can't be matched are passed over. Returns what the user is to be told,
 /// in his language; empty when all went well.

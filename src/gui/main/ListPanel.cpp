@@ -3,6 +3,7 @@
 #include "gui/main/ListPanel.h"
 
 #include "core/model/DataModel.h"
+#include "core/model/ListOfKind.h"
 #include "gui/look/Text.h"
 #include "gui/main/CutCommands.h"
 #include "gui/table/StoredTable.h"
@@ -93,7 +94,7 @@ void ListPanel::show(core::DataModel& model, core::CadrelerBase* engine, EventTa
     const bool isNew = !m_model || m_dataModel != &model;
     if (isNew) {
         m_model.reset();
-        m_model = std::make_shared<EventTableModel>(m_table, CutCommands::listOf(model, m_listKind), model);
+        m_model = std::make_shared<EventTableModel>(m_table, core::listOf(model, m_listKind), model);
         m_dataModel = &model;
     }
     const Unheard unheard(m_model, listener);
@@ -108,7 +109,7 @@ void ListPanel::show(core::DataModel& model, core::CadrelerBase* engine, EventTa
 void ListPanel::reload()
 {
     if (m_model)
-        m_model->reload(CutCommands::listOf(*m_dataModel, m_listKind));
+        m_model->reload(core::listOf(*m_dataModel, m_listKind));
 }
 
 void ListPanel::restoreSelection()
@@ -142,8 +143,7 @@ void ListPanel::forget(EventTableModel::Listener* listener)
 void ListPanel::updateCounters()
 {
     if (m_model)
-        showCounters(
-            ListCounters::of(CutCommands::listOf(*m_dataModel, m_listKind), m_model->getSelectedRows().count()));
+        showCounters(ListCounters::of(core::listOf(*m_dataModel, m_listKind), m_model->getSelectedRows().count()));
 }
 
 void ListPanel::updateSelected()

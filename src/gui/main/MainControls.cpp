@@ -3,6 +3,7 @@
 #include "gui/main/MainControls.h"
 
 #include "core/edl/EventList.h"
+#include "gui/files/FilePaths.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ButtonTile.h"
 #include "gui/look/FlashTextButton.h"
@@ -126,14 +127,6 @@ juce::Rectangle<int> toRectangle(const MainLayout::Box& box)
 juce::Rectangle<float> toRectangle(const MainLayout::Area& area)
 {
     return {area.x, area.y, area.width, area.height};
-}
-
-std::vector<std::string> pathsOf(const juce::StringArray& files)
-{
-    std::vector<std::string> paths;
-    for (const juce::String& file : files)
-        paths.push_back(file.toStdString());
-    return paths;
 }
 
 } // namespace

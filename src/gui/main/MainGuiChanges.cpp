@@ -5,6 +5,7 @@
 #include "core/conform/CadrelerBase.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
+#include "core/model/ListOfKind.h"
 #include "core/notify/ChangeContext.h"
 #include "gui/guard/Guard.h"
 #include "gui/main/CutCommands.h"
@@ -138,7 +139,7 @@ void MainGui::showList(std::int32_t listKind)
     panel.reload();
     panel.updateCounters();
     panel.storeSelection();
-    m_editDialog.listChanged(CutCommands::listOf(*m_model, listKind));
+    m_editDialog.listChanged(core::listOf(*m_model, listKind));
     if (listKind == ListKind::Change)
         guardSystem([this] { m_controls.timeline().setEvents(m_model->changeEdl()); });
     showPreviewState();

@@ -4,6 +4,7 @@
 
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
+#include "core/model/ListOfKind.h"
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextNotificationBase.h"
 #include "gui/main/CutCommands.h"
@@ -60,7 +61,7 @@ protected:
         m_model.setNotifier(nullptr);
     }
 
-    core::EventList& list(int kind) { return gui::CutCommands::listOf(m_model, kind); }
+    core::EventList& list(int kind) { return core::listOf(m_model, kind); }
     /// Numbered events of a list, five seconds each, that touch. The sources of the change list are in the old list, and its
     /// destinations in the new one.
     void fill(int kind, std::uint32_t count)
