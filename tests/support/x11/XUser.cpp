@@ -57,14 +57,40 @@ void XUser::button(unsigned int number)
     XSync(m_display, False);
 }
 
-void XUser::click()
+void XUser::click(unsigned long held)
 {
-    button(1);
+    change(held, true);
+    button(Button1);
+    change(held, false);
+    XSync(m_display, False);
+}
+
+void XUser::doubleClick()
+{
+    click();
+    click();
+}
+
+void XUser::rightClick()
+{
+    button(Button3);
 }
 
 void XUser::wheelUp()
 {
-    button(4);
+    button(Button4);
+}
+
+void XUser::wheelDown()
+{
+    button(Button5);
+}
+
+void XUser::type(std::string_view text)
+{
+    // The keysyms of these are their characters.
+    for (const char character : text)
+        press(static_cast<unsigned char>(character));
 }
 
 void XUser::press(unsigned long key, unsigned long held, unsigned long heldToo)

@@ -6,7 +6,9 @@
 
 #include <X11/Xlib.h>
 #include <X11/Xutil.h>
+#include <png.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <stdexcept>
 
@@ -22,6 +24,11 @@ std::string nameOf(KeySym symbol)
         return "character " + std::to_string(symbol - Unicode);
     const char* const name = XKeysymToString(symbol);
     return name ? name : "key " + std::to_string(symbol);
+}
+
+Window windowOf(standin::NativeWindow& window)
+{
+    return static_cast<Window>(reinterpret_cast<std::uintptr_t>(window.parent()));
 }
 
 } // namespace
@@ -137,7 +144,7 @@ void XWindows::serve()
 
 void XWindows::destroy(standin::NativeWindow& window)
 {
-    XDestroyWindow(m_display, static_cast<Window>(reinterpret_cast<std::uintptr_t>(window.parent())));
+    XDestroyWindow(m_display, windowOf(window));
     XSync(m_display, False);
 }
 
@@ -147,6 +154,60 @@ unsigned long XWindows::colourAt(int x, int y) const
     const unsigned long colour = XGetPixel(image, 0, 0) & 0xffffffUL;
     XDestroyImage(image);
     return colour;
+}
+
+int XWindows::windowCount() const
+{
+    Window root = 0;
+    Window parent = 0;
+    Window* windows = nullptr;
+    unsigned count = 0;
+    XQueryTree(m_display, DefaultRootWindow(m_display), &root, &parent, &windows, &count);
+    const auto isShown = [this](Window window) {
+        XWindowAttributes attributes;
+        return XGetWindowAttributes(m_display, window, &attributes) != 0 && attributes.map_state == IsViewable;
+    };
+    const auto shown = std::count_if(windows, windows + count, isShown);
+    if (windows)
+        XFree(windows);
+    return static_cast<int>(shown);
+}
+
+XWindows::Picture XWindows::pictureOf(standin::NativeWindow& window) const
+{
+    XWindowAttributes place;
+    XGetWindowAttributes(m_display, windowOf(window), &place);
+    Picture picture{static_cast<unsigned>(place.width), static_cast<unsigned>(place.height), {}};
+    // From the screen, so that menus are in it.
+    XImage* const image = XGetImage(m_display, DefaultRootWindow(m_display), place.x, place.y, picture.width,
+                                    picture.height, AllPlanes, ZPixmap);
+    picture.pixels.reserve(std::size_t{3} * picture.width * picture.height);
+    for (int y = 0; y < place.height; ++y) {
+        for (int x = 0; x < place.width; ++x) {
+            const unsigned long colour = XGetPixel(image, x, y);
+            for (const int shift : {16, 8, 0})
+                picture.pixels.push_back(static_cast<std::uint8_t>(colour >> shift));
+        }
+    }
+    XDestroyImage(image);
+    return picture;
+}
+
+std::vector<std::uint8_t> XWindows::pixelsOf(standin::NativeWindow& window) const
+{
+    return pictureOf(window).pixels;
+}
+
+void XWindows::writePicture(standin::NativeWindow& window, const std::filesystem::path& file) const
+{
+    const Picture picture = pictureOf(window);
+    png_image header{};
+    header.version = PNG_IMAGE_VERSION;
+    header.width = picture.width;
+    header.height = picture.height;
+    header.format = PNG_FORMAT_RGB;
+    if (png_image_write_to_file(&header, file.c_str(), 0, picture.pixels.data(), 0, nullptr) == 0)
+        throw std::runtime_error("can't write " + file.string());
 }
 
 } // namespace cadrel::tests
