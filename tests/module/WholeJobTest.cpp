@@ -6,6 +6,7 @@
 #include "gui/table/StoredTable.h"
 #include "host/track/TrackRole.h"
 #include "standin/project/Track.h"
+#include "tests/module/HarbourFilm.h"
 #include "tests/module/LoadedWindow.h"
 
 #include <gtest/gtest.h>
@@ -13,7 +14,6 @@
 #include <X11/keysym.h>
 
 #include <optional>
-#include <string_view>
 #include <utility>
 
 namespace cadrel::tests {
@@ -40,32 +40,10 @@ const Texts ConformedEffects = {"leader 52 57",     "2-pop 58 58.5",           "
 const Texts Wind = {"wind 60 96", "wind 2 3660 3684"};
 const Texts ConformedWind = {"wind 60 70", "wind 74 100", "wind 2 3660 3670", "wind 2 3670 3682"};
 
-/// The film of the example with two short reels, with the old picture on a track and the new one in the pool. Each step of the job
-/// goes on from the one before.
+/// Each step of the job goes on from the one before.
 class WholeJobTest : public LoadedWindow {
 protected:
-    WholeJobTest()
-    {
-        std::string film = contentOf(std::filesystem::path(treePath("examples/tworeels/tworeels.stage")));
-        insertAfter(
-            film, "\"pool\": [",
-            R"({"number": 4, "kind": "video", "name": "harbour_v1", "path": "/pix/harbour_v1.mov", "length": 60},
-    {"number": 5, "kind": "video", "name": "harbour_v2", "path": "/pix/harbour_v2.mov", "length": 100},)");
-        insertAfter(film, "\"tracks\": [",
-                    R"({"kind": "video", "name": "Picture", "events": [
-        {"kind": "clip", "start": 60, "end": 96, "clip": 4, "name": "harbour_v1"},
-        {"kind": "clip", "start": 3660, "end": 3684, "clip": 4, "offset": 36, "name": "harbour_v1"}
-    ]},)");
-        writeFile(m_file, film);
-    }
-
-    static void insertAfter(std::string& text, std::string_view place, const std::string& inserted)
-    {
-        const std::size_t at = text.find(place);
-        if (at == std::string::npos)
-            throw std::runtime_error("the film has another form");
-        text.insert(at + place.size(), inserted);
-    }
+    WholeJobTest() { writeHarbourFilm(m_file); }
 
     // ---- Steps
 
@@ -116,7 +94,7 @@ protected:
 
 void WholeJobTest::addCuts()
 {
-    takeFiles({treePath("examples/tworeels/old.edl")});
+    takeFiles({exampleFile("tworeels/old.edl")});
     click(Main, "Load Old Edl Button");
     click(Files, "Open Files Button");
     picture("job-01-add");
@@ -125,7 +103,7 @@ void WholeJobTest::addCuts()
     EXPECT_EQ(events(ListKind::Old).size(), 5U);
     EXPECT_EQ(events(ListKind::Old).front(), "T01 10:00:00:00 10:00:10:00 01:00:00:00 01:00:10:00");
 
-    takeFiles({treePath("examples/tworeels/new.edl")});
+    takeFiles({exampleFile("tworeels/new.edl")});
     click(Main, "Load New Edl Button");
     click(Files, "Open Files Button");
     click(Files, "Ok Button");

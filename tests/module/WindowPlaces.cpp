@@ -62,4 +62,12 @@ WindowPlaces::Place WindowPlaces::at(const std::string& sheet, const std::string
     return found->place;
 }
 
+std::vector<WindowPlaces::Place> WindowPlaces::all() const
+{
+    std::vector<Place> places;
+    for (const Control& control : m_controls)
+        places.push_back(control.place);
+    return places;
+}
+
 } // namespace cadrel::tests

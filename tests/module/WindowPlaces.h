@@ -25,6 +25,8 @@ public:
     /// A control of a sheet or, with an empty name, of the window itself: by its name, and by the text by which the user knows it
     /// where that isn't empty. Throws std::runtime_error unless there is exactly one.
     Place at(const std::string& sheet, const std::string& name, const std::string& text = "") const;
+    /// Of all controls.
+    std::vector<Place> all() const;
 
 private:
     struct Control {

@@ -5,6 +5,7 @@
 #include <X11/XKBlib.h>
 #include <X11/Xlib.h>
 #include <X11/extensions/XTest.h>
+#include <X11/keysym.h>
 
 #include <stdexcept>
 
@@ -71,6 +72,14 @@ void XUser::doubleClick()
     click();
 }
 
+void XUser::dragTo(int x, int y)
+{
+    XTestFakeButtonEvent(m_display, Button1, True, CurrentTime);
+    moveTo(x, y);
+    XTestFakeButtonEvent(m_display, Button1, False, CurrentTime);
+    XSync(m_display, False);
+}
+
 void XUser::rightClick()
 {
     button(Button3);
@@ -88,9 +97,12 @@ void XUser::wheelDown()
 
 void XUser::type(std::string_view text)
 {
-    // The keysyms of these are their characters.
-    for (const char character : text)
-        press(static_cast<unsigned char>(character));
+    for (const char character : text) {
+        // The keysyms of these are their characters.
+        const KeySym symbol = static_cast<unsigned char>(character);
+        const bool isPlain = XkbKeycodeToKeysym(m_display, XKeysymToKeycode(m_display, symbol), 0, 0) == symbol;
+        press(symbol, isPlain ? 0 : XK_Shift_L);
+    }
 }
 
 void XUser::press(unsigned long key, unsigned long held, unsigned long heldToo)
