@@ -9,6 +9,7 @@
 #include <png.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <stdexcept>
 
@@ -173,40 +174,61 @@ int XWindows::windowCount() const
     return static_cast<int>(shown);
 }
 
-XWindows::Picture XWindows::pictureOf(standin::NativeWindow& window) const
-{
-    XWindowAttributes place;
-    XGetWindowAttributes(m_display, windowOf(window), &place);
-    Picture picture{static_cast<unsigned>(place.width), static_cast<unsigned>(place.height), {}};
-    // From the screen, so that menus are in it.
-    XImage* const image = XGetImage(m_display, DefaultRootWindow(m_display), place.x, place.y, picture.width,
-                                    picture.height, AllPlanes, ZPixmap);
-    picture.pixels.reserve(std::size_t{3} * picture.width * picture.height);
-    for (int y = 0; y < place.height; ++y) {
-        for (int x = 0; x < place.width; ++x) {
-            const unsigned long colour = XGetPixel(image, x, y);
-            for (const int shift : {16, 8, 0})
-                picture.pixels.push_back(static_cast<std::uint8_t>(colour >> shift));
-        }
+/// Of the screen, so that menus are in it.
+class XWindows::Picture {
+public:
+    Picture(Display* display, Window window)
+    {
+        XWindowAttributes place;
+        XGetWindowAttributes(display, window, &place);
+        m_image = XGetImage(display, DefaultRootWindow(display), place.x, place.y, static_cast<unsigned>(place.width),
+                            static_cast<unsigned>(place.height), AllPlanes, ZPixmap);
+        if (!m_image)
+            throw std::runtime_error("the window isn't on the screen");
     }
-    XDestroyImage(image);
-    return picture;
-}
+    Picture(const Picture&) = delete;
+    Picture& operator=(const Picture&) = delete;
+    ~Picture() { XDestroyImage(m_image); }
 
-std::vector<std::uint8_t> XWindows::pixelsOf(standin::NativeWindow& window) const
+    int width() const { return m_image->width; }
+    int height() const { return m_image->height; }
+    std::vector<char> bytes() const
+    {
+        return {m_image->data, m_image->data + std::ptrdiff_t{m_image->bytes_per_line} * m_image->height};
+    }
+    /// Red, green and blue of each pixel, line by line.
+    std::vector<std::uint8_t> colours() const
+    {
+        std::vector<std::uint8_t> colours;
+        for (int y = 0; y < height(); ++y) {
+            for (int x = 0; x < width(); ++x) {
+                const unsigned long colour = XGetPixel(m_image, x, y);
+                for (const int shift : {16, 8, 0})
+                    colours.push_back(static_cast<std::uint8_t>(colour >> shift));
+            }
+        }
+        return colours;
+    }
+
+private:
+    XImage* m_image;
+};
+
+std::vector<char> XWindows::pixelsOf(standin::NativeWindow& window) const
 {
-    return pictureOf(window).pixels;
+    return Picture(m_display, windowOf(window)).bytes();
 }
 
 void XWindows::writePicture(standin::NativeWindow& window, const std::filesystem::path& file) const
 {
-    const Picture picture = pictureOf(window);
+    const Picture picture(m_display, windowOf(window));
+    const std::vector<std::uint8_t> colours = picture.colours();
     png_image header{};
     header.version = PNG_IMAGE_VERSION;
-    header.width = picture.width;
-    header.height = picture.height;
+    header.width = static_cast<png_uint_32>(picture.width());
+    header.height = static_cast<png_uint_32>(picture.height());
     header.format = PNG_FORMAT_RGB;
-    if (png_image_write_to_file(&header, file.c_str(), 0, picture.pixels.data(), 0, nullptr) == 0)
+    if (png_image_write_to_file(&header, file.c_str(), 0, colours.data(), 0, nullptr) == 0)
         throw std::runtime_error("can't write " + file.string());
 }
 

@@ -4,7 +4,6 @@
 
 #include "standin/window/WindowSystem.h"
 
-#include <cstdint>
 #include <filesystem>
 #include <map>
 #include <string>
@@ -41,20 +40,14 @@ public:
     unsigned long colourAt(int x, int y) const;
     /// The windows on the screen that lie in no other, menus included.
     int windowCount() const;
-    /// What the screen shows of a window of the host, as bytes of red, green and blue, line by line.
-    std::vector<std::uint8_t> pixelsOf(standin::NativeWindow& window) const;
+    /// What the screen shows of a window of the host, menus included, as the server keeps it: to be compared.
+    std::vector<char> pixelsOf(standin::NativeWindow& window) const;
     /// The same as a PNG file. Throws std::runtime_error when it can't be written.
     void writePicture(standin::NativeWindow& window, const std::filesystem::path& file) const;
 
 private:
     class XWindow;
-    struct Picture {
-        unsigned width;
-        unsigned height;
-        std::vector<std::uint8_t> pixels;
-    };
-
-    Picture pictureOf(standin::NativeWindow& window) const;
+    class Picture;
 
     _XDisplay* m_display;
     std::map<unsigned long, XWindow*> m_windows;
