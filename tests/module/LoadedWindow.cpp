@@ -198,7 +198,7 @@ std::vector<std::string> LoadedWindow::clipsOn(const std::u16string& track)
 void LoadedWindow::waitForStillness()
 {
     // Longer than from a change to its being drawn, and shorter than the blinking of a caret.
-    constexpr int StillTurns = 12;
+    constexpr int StillTurns = 8;
     std::vector<char> shown;
     int still = 0;
     expectSoon("the window comes to rest", [&] {
