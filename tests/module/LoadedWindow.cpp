@@ -21,12 +21,6 @@ using Place = WindowPlaces::Place;
 
 namespace {
 
-/// Where XWindows puts the windows of the host.
-constexpr int WindowX = 40;
-constexpr int WindowY = 30;
-constexpr int WindowWidth = 1300;
-constexpr int WindowHeight = 750;
-
 std::string narrow(const std::u16string& text)
 {
     return {text.begin(), text.end()};
@@ -57,7 +51,7 @@ standin::Project& LoadedWindow::open(const std::filesystem::path& file)
 
 void LoadedWindow::moveTo(const Place& place)
 {
-    m_user.moveTo(WindowX + place.x + place.width / 2, WindowY + place.y + place.height / 2);
+    m_user.moveTo(Left + place.x + place.width / 2, Top + place.y + place.height / 2);
 }
 
 void LoadedWindow::click(const std::string& sheet, const std::string& name, const std::string& text)
@@ -133,8 +127,8 @@ Place LoadedWindow::inEditDialog(std::int32_t listKind, int row, const std::stri
     const Place box = m_places.at(Edit, "");
     using gui::MainLayout;
     return m_places.at(Edit, name)
-        .movedBy(MainLayout::besideMouse(mouse.x + mouse.width / 2, box.width, WindowWidth),
-                 MainLayout::besideMouse(mouse.y + mouse.height / 2, box.height, WindowHeight));
+        .movedBy(MainLayout::besideMouse(mouse.x + mouse.width / 2, box.width, Width),
+                 MainLayout::besideMouse(mouse.y + mouse.height / 2, box.height, Height));
 }
 
 // ---- What came of it -----------------------------------------------------------------------------------------------

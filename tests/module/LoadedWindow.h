@@ -36,6 +36,12 @@ protected:
     static constexpr const char* Settings = "m_settingsDialog";
     static constexpr const char* Videos = "m_videosDialog";
 
+    // Where XWindows puts the window, and how large it is, in pixels of the screen.
+    static constexpr int Left = 40;
+    static constexpr int Top = 30;
+    static constexpr int Width = 1300;
+    static constexpr int Height = 750;
+
     /// Opens the project in the host, loads the module and opens its window, which gets the keyboard.
     void start(const std::filesystem::path& project);
     /// Opens a project in the host and makes it the active one.

@@ -117,17 +117,17 @@ void RandomUserTest::openOne(const char* name)
 
 void RandomUserTest::useMouse()
 {
-    static const std::vector<WindowPlaces::Place> places = m_places.all();
+    const std::vector<WindowPlaces::Place> places = m_places.all();
     constexpr std::array<unsigned long, 4> Held{0, 0, XK_Shift_L, XK_Control_L};
-    const WindowPlaces::Place place =
-        m_chance.oneIn(4)
-            ? WindowPlaces::Place{static_cast<int>(m_chance.below(1300)), static_cast<int>(m_chance.below(750)), 1, 1}
-            : places[m_chance.below(places.size())];
-    // Half of all is done to the rows of the change list.
-    if (m_chance.oneIn(4))
-        moveTo(rowPlace(core::ListKind::Change, static_cast<int>(m_chance.below(6))));
-    else
-        moveTo(place);
+    const auto somewhere = [&]() -> WindowPlaces::Place {
+        if (m_chance.oneIn(4))
+            return rowPlace(core::ListKind::Change, static_cast<int>(m_chance.below(6)));
+        if (m_chance.oneIn(4))
+            return {static_cast<int>(m_chance.below(Width)), static_cast<int>(m_chance.below(Height)), 1, 1};
+        return places[m_chance.below(places.size())];
+    };
+    const WindowPlaces::Place place = somewhere();
+    moveTo(place);
     m_log << "mouse " << place.x << ' ' << place.y;
     switch (m_chance.below(8)) {
     case 0:
@@ -141,7 +141,8 @@ void RandomUserTest::useMouse()
         return m_chance.oneIn(2) ? m_user.wheelUp() : m_user.wheelDown();
     case 3:
         m_log << " drag";
-        return m_user.dragTo(40 + static_cast<int>(m_chance.below(1300)), 30 + static_cast<int>(m_chance.below(750)));
+        return m_user.dragTo(Left + static_cast<int>(m_chance.below(Width)),
+                             Top + static_cast<int>(m_chance.below(Height)));
     default:
         return m_user.click(m_chance.oneOf(Held));
     }
