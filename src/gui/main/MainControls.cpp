@@ -119,6 +119,32 @@ std::unique_ptr<juce::Button> makeButton(MainButton button)
     throw std::out_of_range("no such button");
 }
 
+/// The list that the picture of a button doesn't tell.
+std::optional<std::int32_t> listOf(MainButton button)
+{
+    switch (button) {
+    case MainButton::AddOld:
+    case MainButton::ClearOld:
+        return ListKind::Old;
+    case MainButton::AddNew:
+    case MainButton::ClearNew:
+        return ListKind::New;
+    case MainButton::AddChange:
+    case MainButton::ClearChange:
+        return ListKind::Change;
+    default:
+        return std::nullopt;
+    }
+}
+
+/// What a screen reader calls a button without a text.
+juce::String spokenNameOf(MainButton button)
+{
+    const juce::String purpose(MainCommands::purpose(button).c_str());
+    const std::optional<std::int32_t> listKind = listOf(button);
+    return listKind ? translatedText(titleOf(*listKind)) + ", " + purpose : purpose;
+}
+
 juce::Rectangle<int> toRectangle(const MainLayout::Box& box)
 {
     return {box.x, box.y, box.width, box.height};
@@ -145,8 +171,12 @@ MainControls::MainControls(FilesDropped filesDropped) : m_filesDropped(std::move
 
 void MainControls::makeButtons()
 {
-    for (std::size_t index = 0; index < m_buttons.size(); ++index)
-        m_buttons.at(index) = makeButton(static_cast<MainButton>(index));
+    for (std::size_t index = 0; index < m_buttons.size(); ++index) {
+        const auto which = static_cast<MainButton>(index);
+        m_buttons.at(index) = makeButton(which);
+        if (dynamic_cast<PictureButton*>(m_buttons.at(index).get()))
+            m_buttons.at(index)->setTitle(spokenNameOf(which));
+    }
 }
 
 /// The order in which the controls are drawn.

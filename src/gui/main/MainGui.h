@@ -13,6 +13,7 @@
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
+#include <array>
 #include <cstdint>
 #include <functional>
 #include <memory>
@@ -71,6 +72,7 @@ private:
 
     void buttonClicked(juce::Button* button) override;
     void componentVisibilityChanged(juce::Component& component) override;
+    void componentEnablementChanged(juce::Component& component) override;
     void selectionChanged(EventTableModel& model) override;
     void sortChanged(EventTableModel& model) override;
     void editRequested(const std::shared_ptr<core::EventBase>& event, EventTableModel& model,
@@ -82,6 +84,8 @@ private:
     void handle(const core::ChangeContext& context);
     void setModel(core::DataModel* model);
     void closeSheets();
+    /// Empty where the host can't tell it.
+    std::wstring projectPath();
     void letGoOfModel();
     void showModel();
     void showList(std::int32_t listKind);
@@ -97,6 +101,7 @@ private:
     void showCommands();
     void actionEnded(const core::ActionChangeContext& end);
     void focusChangeTable();
+    std::array<Sheet*, 4> sheets() { return {&m_settingsDialog, &m_videosDialog, &m_fileDialog, &m_editDialog}; }
 
     // What the user asks for; in MainGuiCommands.cpp.
 
@@ -134,7 +139,7 @@ private:
     core::ChangeContextNotificationBase* m_notifier = nullptr;
     core::DataModel* m_model = nullptr;
     bool m_isRunRequested = false; ///< until it has ended or was dropped
-    bool m_hadFocus = false;       ///< when the run was requested
+    bool m_hadFocus = false;       ///< when the user asked for the run
     bool m_isPreviewTold = false;  ///< the user knows why the preview that is on shows nothing
     bool m_isModelChanging = false;
     std::wstring m_saveFolder;

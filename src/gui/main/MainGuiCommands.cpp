@@ -104,9 +104,12 @@ void MainGui::start()
         Guard::tell(EngineAnswers::ofReadiness(ready, ActionChangeContext::Run));
         return;
     }
+    m_hadFocus = hasKeyboardFocus(true);
+    const bool wasPreview = m_model->isPreviewActive();
     if (!stopPreview())
         return;
-    m_controls.setOn(MainButton::Source, true);
+    if (wasPreview)
+        m_controls.setOn(MainButton::Source, true);
     const Protection protection = askForProtection();
     if (protection != Protection::None)
         requestRun(protection);
@@ -142,7 +145,6 @@ MainGui::Protection MainGui::askForProtection()
 
 void MainGui::requestRun(Protection protection)
 {
-    const bool hadFocus = hasKeyboardFocus(true);
     Result::Type answer = Result::Ok;
     if (protection == Protection::Kept) {
         // While the user was asked, the list may have changed.
@@ -164,7 +166,6 @@ void MainGui::requestRun(Protection protection)
         return;
     }
     m_isRunRequested = true;
-    m_hadFocus = hadFocus;
     updateEnablement();
 }
 

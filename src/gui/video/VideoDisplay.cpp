@@ -66,7 +66,11 @@ VideoDisplay::VideoDisplay()
     addPicture(m_newImage, m_newTimeLabel);
     m_oldImage.setTitle(m_resultHint.getTitle());
     m_newImage.setTitle(translatedText(L"The picture of the new edit version"));
+    // A label is read as its text.
+    m_oldTimeLabel.setDescription(m_oldImage.getTitle());
+    m_newTimeLabel.setDescription(m_newImage.getTitle());
     addAndMakeVisible(m_resultHint);
+    m_resultHint.setAccessible(false);
     setSize(DefaultWidth, DefaultHeight);
     const juce::Image image = placeholder();
     m_oldImage.setImage(image);
@@ -124,8 +128,7 @@ void VideoDisplay::imageChanged(std::size_t side)
     guardSystem([&] {
         if (!m_active || !m_provider)
             return;
-        juce::ImageComponent& shown = side == VideoProviderBase::NewSide ? m_newImage : m_oldImage;
-        shown.setImage(m_provider->getImage(side));
+        imageOf(side).setImage(m_provider->getImage(side));
     });
 }
 
@@ -133,10 +136,16 @@ void VideoDisplay::requestFrames()
 {
     if (!m_provider)
         return;
-    const auto shown = [this](const Timecode& time) { return m_lastFrame ? VideoFrames::lastBefore(time) : time; };
     m_provider->setLastFrame(m_lastFrame);
-    m_provider->setTime(VideoProviderBase::OldSide, shown(m_oldTime));
-    m_provider->setTime(VideoProviderBase::NewSide, shown(m_newTime));
+    requestFrame(VideoProviderBase::OldSide, m_oldTime);
+    requestFrame(VideoProviderBase::NewSide, m_newTime);
+}
+
+/// Where there is none, the former picture would be one of another time.
+void VideoDisplay::requestFrame(std::size_t side, const Timecode& time)
+{
+    if (!guardSystem([&] { m_provider->setTime(side, m_lastFrame ? VideoFrames::lastBefore(time) : time); }))
+        imageOf(side).setImage(placeholder());
 }
 
 void VideoDisplay::show()

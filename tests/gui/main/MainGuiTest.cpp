@@ -356,11 +356,9 @@ TEST_F(MainGuiTest, FollowsEachList)
     EXPECT_EQ(tableModel("Change").getNumRows(), 5);
 }
 
-TEST_F(MainGuiTest, IgnoresAListThatItDoesNotKnow)
+TEST_F(MainGuiTest, IgnoresAListWithoutAModel)
 {
     showThree();
-    notify(EventListChangeContext(3));
-    notify(EventListChangeContext(-1));
     deactivate();
     notify(EventListChangeContext(ListKind::Old));
 
