@@ -3,6 +3,7 @@
 #include "gui/main/MainGui.h"
 
 #include "core/protect/RunRecord.h"
+#include "core/serialize/ByteArchive.h"
 #include "gui/look/FlashTextButton.h"
 #include "gui/look/Text.h"
 #include "tests/gui/main/ShownWindow.h"
@@ -10,6 +11,7 @@
 #include "tests/support/window/CutTexts.h"
 #include "tests/support/window/GermanTexts.h"
 
+#include <functional>
 #include <optional>
 
 namespace cadrel::tests {
@@ -1069,6 +1071,63 @@ TEST_F(MainGuiTest, MarksVfxShotsAtOnceWhenTheSettingsClose)
     m_window.press(juce::KeyPress::escapeKey);
 
     EXPECT_TRUE(list(ListKind::Old).at(0).vfx());
+}
+
+TEST_F(MainGuiTest, TellsOnceOfAVfxNameThatCannotBeUsedInWhateverWayTheSettingsClose)
+{
+    const Texts once{L"A VFX name of the settings can't be used. Correct it there."};
+    fill(ListKind::Old, 1);
+    activate();
+    m_model.settings().setVfxPattern({"A00", "", true}, 0);
+    m_model.settings().setVfxPattern({"(", "", true}, 1);
+    const std::vector<std::function<void()>> ways{[this] { m_window.press(juce::KeyPress::escapeKey); },
+                                                  [this] { m_window.press(juce::KeyPress::returnKey); },
+                                                  [this] { m_window.click(juce::Point<int>(1200, 300)); }};
+    for (const auto& close : ways) {
+        m_alerts.messages.clear();
+        click("Settings Button");
+        close();
+
+        EXPECT_FALSE(settingsDialog().isVisible());
+        EXPECT_EQ(m_alerts.messages, once);
+    }
+    EXPECT_FALSE(list(ListKind::Old).at(0).vfx()) << "no name counts until all can be used";
+}
+
+TEST_F(MainGuiTest, SaysNothingOfAVfxNameWhenTheProjectComesOrGoes)
+{
+    fill(ListKind::Old, 1);
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    activate();
+    for (const char* const open : {"Settings Button", "Load Old Edl Button"}) {
+        click(open);
+        deactivate();
+        activate();
+        click(open);
+        DataModel other;
+        notify(core::DataModelChangeContext(&other));
+        activate();
+    }
+    click("Settings Button");
+    m_gui.reset();
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+}
+
+TEST_F(MainGuiTest, TellsOfAVfxNameAfterAnUndoOnlyWhenTheSettingsClose)
+{
+    fill(ListKind::Old, 1);
+    activate();
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    core::serialize::ByteArchive before;
+    before << m_model;
+    click("Settings Button");
+    m_model.restore(before);
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+    ASSERT_TRUE(settingsDialog().isVisible());
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_EQ(m_alerts.messages.size(), 1U);
 }
 
 TEST_F(MainGuiTest, ShowsSettingsThatChangeElsewhere)
