@@ -119,8 +119,13 @@ private:
     };
     /// Asks the user where there is something to ask. None also when everything has changed meanwhile.
     Protection askForProtection();
+    /// Whether the run goes on from where the sound stands, or the user wants it nevertheless.
+    bool mayRepeat();
+    /// The button that the user has pressed, counted from 1; 0 when no run can begin any more.
+    std::int32_t askBeforeRun(const std::wstring& question, const std::vector<const wchar_t*>& buttons);
     core::ProtectedRun plannedRun() const;
     void requestRun(Protection protection);
+    void noteRun();
     void switchPreview(bool isOn);
     /// False when the model is another one now.
     bool stopPreview();

@@ -110,7 +110,7 @@ void MainGui::showModel()
     resized();
     for (const std::int32_t listKind : {ListKind::Change, ListKind::Old, ListKind::New}) {
         m_controls.panel(listKind).restoreSelection();
-        m_controls.panel(listKind).updateCounters();
+        m_controls.panel(listKind).updateSelected();
     }
     showSelection();
 }

@@ -8,6 +8,7 @@
 #include "core/model/DataModelCommandCreator.h"
 #include "core/notify/ChangeContext.h"
 #include "core/protect/ProtectedRun.h"
+#include "core/protect/RunRecord.h"
 #include "core/time/Timecode.h"
 #include "gui/files/EdlFolder.h"
 #include "gui/guard/Guard.h"
@@ -17,6 +18,7 @@
 #include "gui/main/KeepQuestion.h"
 #include "gui/main/MainCommands.h"
 #include "gui/main/MainGui.h"
+#include "gui/main/RepeatQuestion.h"
 #include "gui/main/SavedChangeEdl.h"
 #include "gui/services/AlertWindowBase.h"
 #include "gui/services/FileBrowserDialogBase.h"
@@ -110,6 +112,8 @@ void MainGui::start()
         return;
     if (wasPreview)
         m_controls.setOn(MainButton::Source, true);
+    if (!mayRepeat())
+        return;
     const Protection protection = askForProtection();
     if (protection != Protection::None)
         requestRun(protection);
@@ -132,15 +136,38 @@ MainGui::Protection MainGui::askForProtection()
         question.canKeep()
             ? Answers{{L"Keep", Protection::Kept}, {L"Don't Keep", Protection::Plain}, {L"Cancel", Protection::None}}
             : Answers{{L"Cancel", Protection::None}, {L"Don't Keep", Protection::Plain}};
+    std::vector<const wchar_t*> buttons;
+    for (const auto& [button, protection] : answers)
+        buttons.push_back(button);
+    const std::int32_t pressed = askBeforeRun(question.text(), buttons);
+    return pressed == 0 ? Protection::None : answers[static_cast<std::size_t>(pressed) - 1].second;
+}
+
+bool MainGui::mayRepeat()
+{
+    const std::wstring question = RepeatQuestion::text(*m_model);
+    if (question.empty())
+        return true;
+    constexpr std::int32_t StartAnyway = 2;
+    return askBeforeRun(question, {L"Cancel", L"Start Anyway"}) == StartAnyway;
+}
+
+std::int32_t MainGui::askBeforeRun(const std::wstring& question, const std::vector<const wchar_t*>& buttons)
+{
     const juce::Component::SafePointer<MainGui> self(this);
     const core::DataModel* const model = m_model;
-    const std::int32_t pressed = AlertWindowBase::instance().show(
-        question.text(), answers[0].first, answers[1].first, answers.size() > 2 ? answers[2].first : std::wstring());
+    const std::int32_t pressed = AlertWindowBase::instance().show(question, buttons[0], buttons[1],
+                                                                  buttons.size() > 2 ? buttons[2] : std::wstring());
     const bool isSame = self && m_model == model && m_model && isEnabled() && m_controls.isEnabled();
-    if (!isSame || pressed < 1 || pressed > static_cast<std::int32_t>(answers.size()) ||
-        m_engine->canStart() != Result::Ok)
-        return Protection::None;
-    return answers[static_cast<std::size_t>(pressed) - 1].second;
+    const bool isButton = pressed >= 1 && pressed <= static_cast<std::int32_t>(buttons.size());
+    return isSame && isButton && m_engine->canStart() == Result::Ok ? pressed : 0;
+}
+
+/// The sound stands in the new cut as it is.
+void MainGui::noteRun()
+{
+    const auto command = core::createDataModelCommand(translated(L"Apply Cadrel"));
+    core::RunRecord::addRun(*m_model, core::RunRecord::allowedBy(m_model->settings()));
 }
 
 void MainGui::requestRun(Protection protection)
@@ -150,6 +177,7 @@ void MainGui::requestRun(Protection protection)
         // While the user was asked, the list may have changed.
         const core::ProtectedRun run = plannedRun();
         if (!run.needsRun()) {
+            noteRun();
             Guard::tell(translated(L"Everything stands where the new cut has it. Nothing has to change."));
             return;
         }

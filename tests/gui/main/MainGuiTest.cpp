@@ -2,6 +2,8 @@
 
 #include "gui/main/MainGui.h"
 
+#include "core/protect/RunRecord.h"
+#include "core/serialize/ByteArchive.h"
 #include "gui/look/FlashTextButton.h"
 #include "gui/look/Text.h"
 #include "tests/gui/main/ShownWindow.h"
@@ -9,6 +11,7 @@
 #include "tests/support/window/CutTexts.h"
 #include "tests/support/window/GermanTexts.h"
 
+#include <functional>
 #include <optional>
 
 namespace cadrel::tests {
@@ -1068,6 +1071,63 @@ TEST_F(MainGuiTest, MarksVfxShotsAtOnceWhenTheSettingsClose)
     EXPECT_TRUE(list(ListKind::Old).at(0).vfx());
 }
 
+TEST_F(MainGuiTest, TellsOnceOfAVfxNameThatCannotBeUsedInWhateverWayTheSettingsClose)
+{
+    const Texts once{L"A VFX name of the settings can't be used. Correct it there."};
+    fill(ListKind::Old, 1);
+    activate();
+    m_model.settings().setVfxPattern({"A00", "", true}, 0);
+    m_model.settings().setVfxPattern({"(", "", true}, 1);
+    const std::vector<std::function<void()>> ways{[this] { m_window.press(juce::KeyPress::escapeKey); },
+                                                  [this] { m_window.press(juce::KeyPress::returnKey); },
+                                                  [this] { m_window.click(juce::Point<int>(1200, 300)); }};
+    for (const auto& close : ways) {
+        m_alerts.messages.clear();
+        click("Settings Button");
+        close();
+
+        EXPECT_FALSE(settingsDialog().isVisible());
+        EXPECT_EQ(m_alerts.messages, once);
+    }
+    EXPECT_FALSE(list(ListKind::Old).at(0).vfx()) << "no name counts until all can be used";
+}
+
+TEST_F(MainGuiTest, SaysNothingOfAVfxNameWhenTheProjectComesOrGoes)
+{
+    fill(ListKind::Old, 1);
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    activate();
+    for (const char* const open : {"Settings Button", "Load Old Edl Button"}) {
+        click(open);
+        deactivate();
+        activate();
+        click(open);
+        DataModel other;
+        notify(core::DataModelChangeContext(&other));
+        activate();
+    }
+    click("Settings Button");
+    m_gui.reset();
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+}
+
+TEST_F(MainGuiTest, TellsOfAVfxNameAfterAnUndoOnlyWhenTheSettingsClose)
+{
+    fill(ListKind::Old, 1);
+    activate();
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    core::serialize::ByteArchive before;
+    before << m_model;
+    click("Settings Button");
+    m_model.restore(before);
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+    ASSERT_TRUE(settingsDialog().isVisible());
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_EQ(m_alerts.messages.size(), 1U);
+}
+
 TEST_F(MainGuiTest, ShowsSettingsThatChangeElsewhere)
 {
     activate();
@@ -1276,6 +1336,83 @@ TEST_F(MainGuiProtectionTest, TellsThatNothingHasToChange)
     click("Cadrel Button");
 
     EXPECT_EQ(m_alerts.messages.back(), L"Everything stands where the new cut has it. Nothing has to change.");
+    EXPECT_EQ(m_engine.calls, Calls());
+    // It counts as done, so that the next one can go on from there.
+    EXPECT_EQ(m_undo.entries, Texts{L"Apply Cadrel"});
+    const auto noted = core::RunRecord::find(m_model);
+    ASSERT_TRUE(noted);
+    EXPECT_EQ(noted->firstDifference(list(ListKind::New)), std::nullopt);
+}
+
+// ---- A run that has been done --------------------------------------------------------------------------------------
+
+class MainGuiRepeatTest : public ShownWindow {
+protected:
+    MainGuiRepeatTest()
+    {
+        list(ListKind::Change).add(makeEvent("A001", "01:00:00:00", "01:00:15:00", "01:00:10:00", "01:00:25:00", 1));
+        m_engine.material = {{3600, 3615}};
+        activate();
+        core::RunRecord::addRun(m_model, core::PastRuns::AllTime);
+    }
+};
+
+TEST_F(MainGuiRepeatTest, StartsTheSameRunAgainOnlyWhenTheUserWantsThat)
+{
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_alerts.messages[0].substr(0, 61), L"This Change EDL has been carried out in the project already.\n");
+    EXPECT_EQ(m_alerts.buttons[0], (Texts{L"Cancel", L"Start Anyway"}));
+    EXPECT_EQ(m_engine.calls, Calls());
+    EXPECT_TRUE(m_gui->isEnabled());
+    m_alerts.answer = 2;
+    click("Cadrel Button");
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+}
+
+TEST_F(MainGuiRepeatTest, StartsNoRunWhenTheUserClosesTheQuestion)
+{
+    for (const std::int32_t answer : {0, 3}) {
+        m_alerts.answer = answer;
+        click("Cadrel Button");
+    }
+
+    EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiRepeatTest, AsksThenAlsoWhatIsToBeKept)
+{
+    m_engine.material.push_back({5 * 3600, 5 * 3600 + 60});
+    m_alerts.answer = 2;
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.buttons.size(), 2U);
+    EXPECT_EQ(m_alerts.buttons[1], (Texts{L"Keep", L"Don't Keep", L"Cancel"}));
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+}
+
+TEST_F(MainGuiRepeatTest, AsksNothingWhereNoRunCanBeReadFromTheProject)
+{
+    for (const char* const note : {"", "no bytes of runs"}) {
+        m_model.setProperty(PropertyKey::DoneRuns, core::Variant(note));
+        click("Cadrel Button");
+        notify(ActionChangeContext(ActionChangeContext::Run, Result::Ok));
+    }
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+    EXPECT_EQ(m_engine.calls, (Calls{"run", "run"}));
+}
+
+TEST_F(MainGuiRepeatTest, StartsNoRunWhenTheProjectGoesDuringTheQuestion)
+{
+    m_alerts.answer = 2;
+    m_alerts.meanwhile = [this] { deactivate(); };
+    click("Cadrel Button");
+    activate();
+    m_alerts.meanwhile = [this] { m_gui.reset(); };
+    click("Cadrel Button");
+
     EXPECT_EQ(m_engine.calls, Calls());
 }
 
