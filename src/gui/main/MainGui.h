@@ -10,6 +10,7 @@
 #include "gui/settings/SettingsDialog.h"
 #include "gui/table/EventTableModel.h"
 #include "gui/video/NewVideosDialog.h"
+#include "util/Result.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
@@ -30,6 +31,7 @@ class ProtectedRun;
 
 namespace cadrel::gui {
 
+class KeepQuestion;
 class VideoProviderBase;
 
 /// The window of Cadrel. It shows the model that its notifier names, asks the engine for what is to be done, and draws itself
@@ -117,14 +119,17 @@ private:
         Kept,
         None, ///< there is no run
     };
-    /// Asks the user where there is something to ask. None also when everything has changed meanwhile.
-    Protection askForProtection();
+    /// Asks the user where there is something to ask, and again where that has changed meanwhile. The run becomes the one that he
+    /// was asked about. None also when no run can begin any more.
+    Protection askForProtection(core::ProtectedRun& run);
+    Protection answerTo(const KeepQuestion& question);
     /// Whether the run goes on from where the sound stands, or the user wants it nevertheless.
     bool mayRepeat();
     /// The button that the user has pressed, counted from 1; 0 when no run can begin any more.
     std::int32_t askBeforeRun(const std::wstring& question, const std::vector<const wchar_t*>& buttons);
     core::ProtectedRun plannedRun() const;
-    void requestRun(Protection protection);
+    void requestRun(Protection protection, const core::ProtectedRun& run);
+    util::Result::Type requestKeptRun(const core::ProtectedRun& run);
     void noteRun();
     void switchPreview(bool isOn);
     /// False when the model is another one now.
