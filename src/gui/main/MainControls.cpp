@@ -267,7 +267,7 @@ void MainControls::resized()
 
 void MainControls::enablementChanged()
 {
-    // The hints are dimmed.
+    // Titles and hints are dimmed.
     guardSystem([this] { repaint(); });
 }
 
@@ -290,7 +290,8 @@ void MainControls::paintPanel(juce::Graphics& graphics, std::int32_t listKind) c
     graphics.drawRoundedRectangle(panel, PanelCorner, FrameThickness);
     const MainLayout::Area title = places.title(listKind);
     drawText(graphics, translatedText(titleOf(listKind)), title.x, title.y, title.width, title.height,
-             juce::Justification::centred, getFont(TitleFont), toColour(Palette::frame), true);
+             juce::Justification::centred, getFont(TitleFont), toColour(Palette::frame).withAlpha(opacityOf(*this)),
+             true);
     if (listKind == ListKind::Change) {
         const MainLayout::Rule rule = places.rule();
         graphics.setColour(toColour(Palette::frame));
@@ -307,7 +308,7 @@ void MainControls::paintOverChildren(juce::Graphics& graphics)
             const juce::String& hint = m_hints.at(static_cast<std::size_t>(listKind));
             const juce::Rectangle<int> table = toRectangle(layout().table(listKind));
             if (!hint.isEmpty()) {
-                graphics.setColour(toColour(Palette::text).withAlpha(isEnabled() ? 1.0F : DisabledOpacity));
+                graphics.setColour(toColour(Palette::text).withAlpha(opacityOf(*this)));
                 graphics.setFont(getFont(HintFont));
                 graphics.drawFittedText(hint, table.reduced(HintMargin, HintMargin), juce::Justification::centred, 3);
             }

@@ -3,6 +3,7 @@
 #include "gui/video/VideoDisplay.h"
 
 #include "gui/guard/Guard.h"
+#include "gui/look/ButtonTile.h"
 #include "gui/look/Text.h"
 #include "gui/video/VideoFrames.h"
 
@@ -189,6 +190,15 @@ void VideoDisplay::resized()
     });
 }
 
+void VideoDisplay::enablementChanged()
+{
+    guardSystem([this] {
+        for (juce::ImageComponent* const picture : {&m_oldImage, &m_newImage})
+            picture->setAlpha(opacityOf(*this));
+        repaint();
+    });
+}
+
 void VideoDisplay::parentHierarchyChanged()
 {
     guardSystem([this] { updatePictureSize(); });
@@ -213,7 +223,7 @@ void VideoDisplay::paint(juce::Graphics& graphics)
         graphics.drawRoundedRectangle(panel, CornerSize, OutlineThickness);
         const auto width = static_cast<float>(getWidth());
         drawText(graphics, translatedText(L"Video"), 0.0F, 2.0F, width, TitleHeight, juce::Justification::centred,
-                 getFont(TitleFont), toColour(Palette::frame), true);
+                 getFont(TitleFont), toColour(Palette::frame).withAlpha(opacityOf(*this)), true);
         graphics.setColour(toColour(Palette::band));
         graphics.fillRect(3, 22, getWidth() - 6, 35);
         paintBlock(graphics, blockAt(BlockTop), L"Result");
@@ -226,7 +236,8 @@ void VideoDisplay::paintBlock(juce::Graphics& graphics, juce::Rectangle<int> blo
     graphics.setColour(toColour(Palette::band));
     graphics.fillRect(block);
     drawText(graphics, translatedText(name), 0.0F, static_cast<float>(block.getY()), static_cast<float>(getWidth()),
-             TitleHeight, juce::Justification::centred, getFont(BlockFont), juce::Colours::black, true);
+             TitleHeight, juce::Justification::centred, getFont(BlockFont),
+             juce::Colours::black.withAlpha(opacityOf(*this)), true);
 }
 
 } // namespace cadrel::gui

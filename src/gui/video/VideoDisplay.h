@@ -32,6 +32,7 @@ public:
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;
+    void enablementChanged() override;
     /// The display may have come to a screen with another scale.
     void parentHierarchyChanged() override;
 

@@ -228,6 +228,15 @@ protected:
         }
         return false;
     }
+    /// Of the headers of a table, all in all.
+    float brightness(const std::string& name) const
+    {
+        const juce::Image image = table(name).createComponentSnapshot(table(name).getLocalBounds());
+        float sum = 0.0F;
+        for (int column = 0; column < image.getWidth(); ++column)
+            sum += image.getPixelAt(column, 10).getBrightness();
+        return sum;
+    }
     std::string timeline() const
     {
         std::string text;
@@ -459,6 +468,28 @@ TEST_F(MainGuiChangesTest, LayOutEverySheetAtAnySize)
         EXPECT_EQ(videosDialog().getBounds(), whole);
         EXPECT_EQ(fileDialog().getBounds(), whole);
     }
+}
+
+TEST_F(MainGuiChangesTest, DimWhatCannotBeUsed)
+{
+    showThree();
+    EXPECT_EQ(timeline(), "events events ");
+    const std::vector<std::string> names{"Old", "New", "Change"};
+    std::vector<float> full;
+    for (const std::string& name : names)
+        full.push_back(brightness(name));
+    const auto expectDimmed = [&](bool isDimmed) {
+        for (std::size_t index = 0; index < names.size(); ++index)
+            EXPECT_EQ(brightness(names[index]) < 0.8F * full[index], isDimmed) << names[index];
+        EXPECT_EQ(timeline(), isDimmed ? "- - " : "events events ");
+        EXPECT_NEAR(find<juce::ImageComponent>(video(), "Old Image").getAlpha(), isDimmed ? 0.5F : 1.0F, 0.01F);
+    };
+    click("Load Old Edl Button");
+    expectDimmed(true);
+    m_window.press(juce::KeyPress::escapeKey);
+    expectDimmed(false);
+    click("Cadrel Button");
+    expectDimmed(true);
 }
 
 TEST_F(MainGuiChangesTest, KeepTheColoursOfTheCounters)
