@@ -119,12 +119,6 @@ void PastRuns::add(const EventList& oldCut, const EventList& newCut, const Event
     m_runs.push_back(std::move(run));
 }
 
-void PastRuns::forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                              const FrameRange& allowed)
-{
-    forgetWithin(runOf(oldCut, newCut, changes, allowed).extent);
-}
-
 void PastRuns::forgetWithin(const FrameRanges& extent)
 {
     std::erase_if(m_runs, [&extent](const Run& run) { return without(run.left, extent).empty(); });

@@ -42,9 +42,6 @@ public:
     /// old cut there. Shares the events.
     void add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
              const FrameRange& allowed = AllTime);
-    /// Forgets the runs that such a run would hide altogether.
-    void forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                        const FrameRange& allowed = AllTime);
 
     bool isEmpty() const { return m_runs.empty(); }
     std::size_t size() const { return m_runs.size(); }

@@ -40,7 +40,8 @@ struct PropertyKey {
         NewTableSelection = 10018,      ///< string, likewise
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
-        EarlierRuns = 10022,            ///< string, the bytes of PastRuns without the run that the lists tell of
+        EarlierRuns = 10022,            ///< string, of older versions: all runs but the one that the lists tell of
+        DoneRuns = 10023,               ///< string, the bytes of PastRuns; see RunRecord
     };
 };
 
