@@ -39,7 +39,7 @@ public:
 
     /// A run after those before it; the lists are as the model had them. Without both cuts it is one of a change EDL that
     /// was given. A run without events is none. Outside of `allowed` it changed nothing, so that the sound stands in the
-    /// old cut there. Shares the events.
+    /// old cut there. Keeps the events as a project stores them.
     void add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
              const FrameRange& allowed = AllTime);
 
@@ -69,6 +69,8 @@ private:
         bool isOfCuts() const { return !oldCut.isEmpty() || !newCut.isEmpty(); }
     };
 
+    void addStored(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+                   const FrameRange& allowed);
     Run runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
               const FrameRange& allowed) const;
     void forgetWithin(const FrameRanges& extent);
