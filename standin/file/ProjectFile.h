@@ -5,6 +5,7 @@
 #include "util/FileStamp.h"
 #include "velmark/Counted.h"
 
+#include <cstddef>
 #include <filesystem>
 #include <optional>
 #include <stdexcept>
@@ -28,11 +29,12 @@ public:
     using ProjectFileError::ProjectFileError;
 };
 
-/// The form in which projects are stored: JSON, described in docs/project-file.md. The same project always gives the same
-/// bytes, and a project that was read from them gives them again.
+/// Projects in files. In which form one is stored is told by its content, and a project is written in the form in which it
+/// was read. The same project always gives the same bytes.
 class ProjectFile {
 public:
-    static constexpr const char* Extension = ".stage";
+    /// No project's file is larger than this, in bytes.
+    static constexpr std::size_t LargestSize = std::size_t{1} << 31U;
 
     /// Throws ProjectFileError. `log` is the host's.
     static Velmark::Counted<Project> read(const std::filesystem::path& file, ChangeLog& log);
