@@ -269,12 +269,12 @@ void ArdourWriter::insertInto(const TextRange& element, const std::string& name,
     const TextRange tag = startTagOf(element, m_session.text);
     if (tag.end == element.end) {
         // <Name/> becomes <Name>...</Name>.
-        const std::size_t slash = m_session.text.rfind('/', tag.end);
+        const std::size_t slash = m_session.text.rfind('/', tag.end - 1);
         m_patch.replace({slash, tag.end}, std::string(">").append(text).append("\n  </").append(name).append(">"));
         return;
     }
     // Before the blanks that stand before the end tag.
-    std::size_t at = m_session.text.rfind("</", element.end);
+    std::size_t at = m_session.text.rfind("</", element.end - 1);
     while (at > tag.end && std::string_view(" \t\r\n").find(m_session.text[at - 1]) != std::string_view::npos)
         --at;
     m_patch.insert(at, std::move(text));
