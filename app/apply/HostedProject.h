@@ -47,6 +47,9 @@ public:
     /// Interruption::Requested then, and Failure when the run couldn't begin or failed.
     void apply();
 
+    /// Throws Failure where the project can't be written, as far as that is known before a run.
+    void requireTarget(const std::string& file) const;
+
     // The host's own save, in which the model is stored with the project. Each throws Failure, with all files as they were.
 
     /// Over the file that was read. Refused when another program has saved it since.

@@ -38,7 +38,7 @@ Velmark::Counted<Project> ArdourForm::read(std::string text, const fs::path& fil
     Velmark::Counted<Project> project = reader.read(log);
     ArdourSession session = reader.takeSession();
     session.ownAsRead = OwnStorage::textOf(*project);
-    project->setForm(std::make_unique<ArdourForm>(std::move(session)));
+    project->setForm(std::make_unique<ArdourForm>(std::move(session), file.parent_path()));
     return project;
 }
 
@@ -56,6 +56,20 @@ void ArdourForm::requireFree(const fs::path& file) const
                         ", which it would open in place of this session: open the session in Ardour and save it, or "
                         "remove that file");
     }
+}
+
+void ArdourForm::requirePlace(const fs::path& file) const
+{
+    std::error_code error;
+    const fs::path folder = fs::weakly_canonical(m_folder.empty() ? fs::path(".") : m_folder, error);
+    const fs::path target =
+        fs::weakly_canonical(file.parent_path().empty() ? fs::path(".") : file.parent_path(), error);
+    if (error || folder != target) {
+        throw FileFault("lies outside of the session's folder " + quoted(std::string_view(folder.native())) +
+                        ", and Ardour looks for the sound beside the session");
+    }
+    if (file.extension() != Extension)
+        throw FileFault("has another ending than " + std::string(Extension) + ", which Ardour asks for");
 }
 
 void ArdourForm::wasWritten(const fs::path& file) const

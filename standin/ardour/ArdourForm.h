@@ -17,19 +17,29 @@ class ChangeLog;
 /// in the project is changed in it.
 class ArdourForm : public ProjectForm {
 public:
+    static constexpr const char* Extension = ".ardour";
+
     /// Whether it is the text of a session, of whatever version.
     static bool recognises(std::string_view text);
     /// Throws FileFault. Nothing of the project counts as changed.
     static Velmark::Counted<Project> read(std::string text, const std::filesystem::path& file, ChangeLog& log);
 
-    explicit ArdourForm(ArdourSession session) : m_session(std::move(session)) {}
+    /// `folder` is that of the session, with its sound.
+    ArdourForm(ArdourSession session, std::filesystem::path folder)
+        : m_session(std::move(session)), m_folder(std::move(folder))
+    {
+    }
 
     std::string textOf(const Project& project) const override;
     void requireFree(const std::filesystem::path& file) const override;
+    void requirePlace(const std::filesystem::path& file) const override;
     void wasWritten(const std::filesystem::path& file) const override;
+    std::vector<std::string> staying() const override { return m_session.staying; }
+    void setEdgeFade(double seconds) override { m_session.edgeFade = m_session.clock.samplesOf(seconds); }
 
 private:
     ArdourSession m_session;
+    std::filesystem::path m_folder;
 };
 
 } // namespace standin

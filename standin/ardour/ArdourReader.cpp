@@ -19,6 +19,7 @@
 #include <charconv>
 #include <cstring>
 #include <optional>
+#include <system_error>
 
 using Velmark::Counted;
 using Velmark::FrameRateInfo;
@@ -259,8 +260,10 @@ void ArdourReader::readSources(Project& project)
             measure(region);
     }
 
-    const std::filesystem::path folder =
-        m_file.parent_path() / "interchange" / m_root.attribute("name").value() / "audiofiles";
+    // Ardour names the folder of a session's sound after the session's own.
+    std::error_code ignored;
+    const std::filesystem::path session = std::filesystem::absolute(m_file, ignored).parent_path();
+    const std::filesystem::path folder = session / "interchange" / session.filename() / "audiofiles";
     for (const pugi::xml_node& source : m_root.child("Sources").children("Source")) {
         if (std::strcmp(source.attribute("type").value(), "audio") != 0)
             continue;

@@ -4,6 +4,7 @@
 
 #include "standin/ardour/CurveScale.h"
 #include "standin/ardour/SessionClock.h"
+#include "standin/ardour/SessionKey.h"
 #include "standin/ardour/XmlText.h"
 
 #include <cstdint>
@@ -21,17 +22,6 @@ class Project;
 /// An id in a session, under which no other object of it stands.
 using SessionId = std::int64_t;
 
-/// The attributes by which nodes of a project are known as objects of the session that they were read from.
-namespace SessionKey {
-
-inline constexpr const char* Route = "Ardour:Route";
-inline constexpr const char* Region = "Ardour:Region";
-inline constexpr const char* Location = "Ardour:Location";
-/// Of the track of the user's own markers.
-inline constexpr const char* Markers = "Ardour:Markers";
-
-} // namespace SessionKey
-
 /// The name of the location that stands for a marker on a track of Cadrel's.
 inline std::u16string ownLocationName(const std::u16string& track, const std::u16string& marker)
 {
@@ -46,6 +36,9 @@ double contentEnd(const Project& project);
 
 /// The text of a session, and where in it stands what a project can change.
 struct ArdourSession {
+    /// The length of a fade that a region doesn't describe, in samples.
+    static constexpr std::int64_t DefaultFade = 64;
+
     /// All in samples.
     struct Region {
         TextRange text;
@@ -87,7 +80,9 @@ struct ArdourSession {
     std::string ownText;               ///< in it
     std::vector<SessionId> ownMarkers; ///< the locations of the markers in that text, in their order
     std::string ownAsRead;             ///< what would be put there for the project as it was read
-    std::vector<std::string> staying;  ///< what no run moves, in words
+    /// The length of the fade at a new edge, in samples; 64 is Ardour's own.
+    std::int64_t edgeFade = DefaultFade;
+    std::vector<std::string> staying; ///< what no run moves, in words
 };
 
 } // namespace standin

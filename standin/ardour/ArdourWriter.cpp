@@ -118,7 +118,7 @@ void ArdourWriter::writeRegion(SessionId id, const std::vector<RegionPiece>& pie
             giveNewIds(element.node, next);
             text += indentOf(depth);
         }
-        cutRegion(element.node, region, piece, m_session.clock, next);
+        cutRegion(element.node, region, piece, m_session.clock, m_session.edgeFade, next);
         text += printed(element.node, depth);
     }
     m_patch.replace(region.text, std::move(text));

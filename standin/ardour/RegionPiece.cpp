@@ -20,8 +20,7 @@ namespace {
 
 using ListPoints = std::vector<ListPoint>;
 
-/// The length of a fade that a region doesn't describe, in samples.
-constexpr std::int64_t DefaultFade = 64;
+constexpr std::int64_t DefaultFade = ArdourSession::DefaultFade;
 /// Of a fade that is written: the sine of a quarter of a circle in so many steps.
 constexpr int StepsOfAFade = 16;
 
@@ -106,19 +105,27 @@ public:
     EdgeFade(pugi::xml_node& element, const FadeNames& names, RegionEdge edge, const SessionClock& clock)
         : m_element(element), m_names(names), m_edge(edge), m_clock(clock)
     {
-        if (edge == RegionEdge::New) {
-            element.remove_child(names.fade);
-            element.remove_child(names.inverse);
-            set(element, names.isDefault, "1");
-        }
-        if (edge != RegionEdge::Old)
-            set(element, names.active, edge == RegionEdge::New ? "1" : "0");
+        if (edge == RegionEdge::Seam)
+            set(element, names.active, "0");
         m_length = isOn(element, names.active) ? fadeLength(element, names, clock) : 0;
     }
 
     std::int64_t length() const { return m_length; }
     bool isOld() const { return m_edge == RegionEdge::Old; }
 
+    /// At a new edge there is no fade of the user's any more.
+    void begin(std::int64_t length, const std::function<SessionId()>& newId)
+    {
+        if (m_edge != RegionEdge::New)
+            return;
+        m_element.remove_child(m_names.fade);
+        m_element.remove_child(m_names.inverse);
+        set(m_element, m_names.isDefault, "1");
+        set(m_element, m_names.active, length > 0 ? "1" : "0");
+        m_length = length;
+        if (length > 0 && length != DefaultFade)
+            writeFade(m_element, m_names, length, m_clock, newId);
+    }
     void shorten(std::int64_t length, const std::function<SessionId()>& newId)
     {
         if (length >= m_length)
@@ -140,11 +147,13 @@ private:
     std::int64_t m_length = 0;
 };
 
-void cutFades(pugi::xml_node& element, const RegionPiece& piece, const SessionClock& clock,
+void cutFades(pugi::xml_node& element, const RegionPiece& piece, const SessionClock& clock, std::int64_t edgeFade,
               const std::function<SessionId()>& newId)
 {
     EdgeFade in(element, FadeIn, piece.head, clock);
     EdgeFade out(element, FadeOut, piece.tail, clock);
+    in.begin(edgeFade, newId);
+    out.begin(edgeFade, newId);
     if (in.length() + out.length() <= piece.length)
         return;
     // What the user has drawn gives way last.
@@ -232,7 +241,7 @@ void giveNewIds(pugi::xml_node& element, const std::function<SessionId()>& newId
 }
 
 void cutRegion(pugi::xml_node& element, const ArdourSession::Region& region, const RegionPiece& piece,
-               const SessionClock& clock, const std::function<SessionId()>& newId)
+               const SessionClock& clock, std::int64_t edgeFade, const std::function<SessionId()>& newId)
 {
     const std::string start = clock.timeText(piece.start);
     if (clock.hasUnits()) {
@@ -255,7 +264,7 @@ void cutRegion(pugi::xml_node& element, const ArdourSession::Region& region, con
     }
     if (element.attribute("whole-file"))
         set(element, "whole-file", "0");
-    cutFades(element, piece, clock, newId);
+    cutFades(element, piece, clock, edgeFade, newId);
     cutEnvelope(element, region, piece, clock);
 }
 

@@ -48,8 +48,8 @@ std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std
 void giveNewIds(pugi::xml_node& element, const std::function<SessionId()>& newId);
 
 /// Makes the element of a region that of a piece: place, length, fades, gain envelope, sync point. New lists in it get their
-/// ids from `newId`.
+/// ids from `newId`. At a new edge it fades over `edgeFade` samples; 0 is no fade.
 void cutRegion(pugi::xml_node& element, const ArdourSession::Region& region, const RegionPiece& piece,
-               const SessionClock& clock, const std::function<SessionId()>& newId);
+               const SessionClock& clock, std::int64_t edgeFade, const std::function<SessionId()>& newId);
 
 } // namespace standin

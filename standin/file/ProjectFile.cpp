@@ -73,6 +73,27 @@ std::string contentFor(const Project& project)
 
 } // namespace
 
+fs::path ProjectFile::fileIn(const fs::path& path)
+{
+    std::error_code error;
+    if (!fs::is_directory(path, error))
+        return path;
+    fs::path found;
+    for (fs::directory_iterator entry(path, error); !error && entry != fs::directory_iterator();
+         entry.increment(error)) {
+        if (entry->path().extension() != ArdourForm::Extension)
+            continue;
+        if (!found.empty())
+            fail(path.string(), "holds several sessions; name one of them");
+        found = entry->path();
+    }
+    if (error)
+        fail(path.string(), error.message());
+    if (found.empty())
+        fail(path.string(), "is a folder without a session");
+    return found;
+}
+
 Counted<Project> ProjectFile::read(const fs::path& file, ChangeLog& log)
 {
     std::string content = contentOf(file);
@@ -95,12 +116,23 @@ Counted<Project> ProjectFile::parse(std::string_view text, const std::string& na
     }
 }
 
-void ProjectFile::write(const Project& project, const fs::path& file, const std::optional<FileStamp>& expected)
+void ProjectFile::requireWritable(const Project& project, const fs::path& file)
 {
     try {
+        if (!project.form())
+            return;
+        project.form()->requirePlace(file);
+        project.form()->requireFree(file);
+    } catch (const FileFault& fault) {
+        fail(file.string(), fault.what());
+    }
+}
+
+void ProjectFile::write(const Project& project, const fs::path& file, const std::optional<FileStamp>& expected)
+{
+    requireWritable(project, file);
+    try {
         const ProjectForm* const form = project.form();
-        if (form)
-            form->requireFree(file);
         const std::string text = contentFor(project);
         FileReplacement replacement(file);
         replacement.write(text);

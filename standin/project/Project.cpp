@@ -147,7 +147,7 @@ bool Project::accepts(const Node& child) const
     return dynamic_cast<const Track*>(&child) != nullptr;
 }
 
-void Project::setForm(std::unique_ptr<const ProjectForm> form)
+void Project::setForm(std::unique_ptr<ProjectForm> form)
 {
     m_form = std::move(form);
 }

@@ -55,8 +55,8 @@ public:
     const std::u16string& path() const { return m_path; }
     void setPath(std::u16string path) { m_path = std::move(path); }
     /// Null for the host's own form.
-    const ProjectForm* form() const { return m_form.get(); }
-    void setForm(std::unique_ptr<const ProjectForm> form);
+    ProjectForm* form() const { return m_form.get(); }
+    void setForm(std::unique_ptr<ProjectForm> form);
     const Velmark::FrameRateInfo& frameRate() const { return m_frameRate; }
     void setFrameRate(const Velmark::FrameRateInfo& info);
     double timeOrigin() const { return m_timeOrigin; }
@@ -101,7 +101,7 @@ private:
     Velmark::Counted<ProjectLink> m_link;
     UndoList m_undoList;
     std::u16string m_path;
-    std::unique_ptr<const ProjectForm> m_form;
+    std::unique_ptr<ProjectForm> m_form;
     Velmark::FrameRateInfo m_frameRate;
     double m_timeOrigin = 0.0;
     double m_endTime = 0.0;

@@ -5,6 +5,7 @@
 #include "standin/project/AutomationPoint.h"
 #include "standin/project/Marker.h"
 #include "standin/project/MediaClip.h"
+#include "standin/project/ProjectForm.h"
 #include "tests/standin/ardour/SessionText.h"
 
 #include <gtest/gtest.h>
@@ -132,7 +133,7 @@ TEST(ArdourForm, ReadsRegionsAsClips)
     EXPECT_EQ(first.start(), 1.0);
     EXPECT_EQ(first.end(), 3.0);
     EXPECT_EQ(first.sourceOffset(), 0.5);
-    EXPECT_EQ(first.clip()->path(), u"/film/interchange/reel/audiofiles/door.wav");
+    EXPECT_EQ(first.clip()->path(), u"/film/interchange/film/audiofiles/door.wav");
     EXPECT_EQ(first.clip()->seconds(), 2.5);
 }
 
@@ -581,6 +582,40 @@ TEST_F(SessionFolder, IsNotWrittenWhileArdourHasUnsavedWorkThere)
     EXPECT_FALSE(std::filesystem::exists(folder / "new.ardour"));
     ProjectFile::write(*project, folder / "other.ardour");
     EXPECT_TRUE(std::filesystem::exists(folder / "other.ardour"));
+}
+
+TEST_F(SessionFolder, IsTheOnlyPlaceForItsSessions)
+{
+    const auto project = ProjectFile::read(folder / "reel.ardour", log);
+    EXPECT_THROW(ProjectFile::write(*project, folder.parent_path() / "elsewhere.ardour"), ProjectFileError);
+    EXPECT_FALSE(std::filesystem::exists(folder.parent_path() / "elsewhere.ardour"));
+    EXPECT_THROW(ProjectFile::write(*project, folder / "reel.stage"), ProjectFileError);
+    ProjectFile::write(*project, folder / ".." / folder.filename() / "again.ardour");
+    EXPECT_TRUE(std::filesystem::exists(folder / "again.ardour"));
+}
+
+TEST_F(SessionFolder, StandsForItsOnlySession)
+{
+    EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
+    EXPECT_EQ(ProjectFile::fileIn(folder / "reel.ardour"), folder / "reel.ardour");
+    EXPECT_EQ(ProjectFile::fileIn(folder / "missing.ardour"), folder / "missing.ardour");
+    put("reel.ardour.bak", "<Session/>");
+    EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
+    put("other.ardour", "<Session/>");
+    EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);
+    std::filesystem::remove(folder / "other.ardour");
+    std::filesystem::remove(folder / "reel.ardour");
+    EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);
+}
+
+TEST(ArdourForm, TellsWhatNoEditMoves)
+{
+    const SessionProject session(
+        SessionText{.routes = R"(<Route id="22" name="Piano" default-type="midi" midi-playlist="32"/>)",
+                    .playlists = R"(<Playlist id="32" name="Piano" type="midi"/>)"
+                                 R"(<Playlist id="33" name="Dia.1" type="audio"/>)"});
+    EXPECT_EQ(session.project->form()->staying(),
+              (std::vector<std::string>{"the MIDI track \"Piano\"", "the playlist \"Dia.1\""}));
 }
 
 TEST_F(SessionFolder, PutsTheHistoryAsideWhoseRegionsMayBeOthersNow)

@@ -110,6 +110,8 @@ RC_GTEST_PROP(RegionPieceLaw, AllOfAStretchMovesByTheSameSamplesAndStaysWhole, (
 /// The element of a region of 10,000 samples from 1,000, of which a piece is cut.
 class CutRegion : public testing::Test {
 protected:
+    std::int64_t edgeFade = ArdourSession::DefaultFade;
+
     pugi::xml_node cut(const std::string& content, const RegionPiece& piece, const std::string& attributes = "")
     {
         m_document.load_string(("<Region start=\"a2940000\" length=\"a58800000@a5880000\" sync-position=\"a2940000\" "
@@ -118,7 +120,7 @@ protected:
                                 attributes + ">" + content + "</Region>")
                                    .c_str());
         pugi::xml_node element = m_document.document_element();
-        cutRegion(element, Whole, piece, clockAt("48000"), [this] { return m_nextId++; });
+        cutRegion(element, Whole, piece, clockAt("48000"), edgeFade, [this] { return m_nextId++; });
         return element;
     }
     static std::string fade(const std::string& name, long samples, const std::string& values = "0 1")
@@ -158,13 +160,13 @@ TEST_F(CutRegion, KeepsASyncPointThatItStillHas)
     document.load_string("<Region start=\"a2940000\" length=\"a58800000@a5880000\" sync-marked=\"1\" "
                          "sync-position=\"a17640000\"/>");
     pugi::xml_node element = document.document_element();
-    cutRegion(element, Whole, piece, clockAt("48000"), [] { return 1; });
+    cutRegion(element, Whole, piece, clockAt("48000"), edgeFade, [] { return 1; });
     EXPECT_STREQ(element.attribute("sync-marked").value(), "1");
     EXPECT_STREQ(element.attribute("sync-position").value(), "a17640000");
     document.load_string("<Region start=\"a2940000\" length=\"a58800000@a5880000\" sync-marked=\"1\" "
                          "sync-position=\"a3000000\"/>");
     element = document.document_element();
-    cutRegion(element, Whole, piece, clockAt("48000"), [] { return 1; });
+    cutRegion(element, Whole, piece, clockAt("48000"), edgeFade, [] { return 1; });
     EXPECT_STREQ(element.attribute("sync-marked").value(), "0");
 }
 
@@ -182,6 +184,26 @@ TEST_F(CutRegion, FadesAtANewEdgeEvenWhereTheUserHadNoFade)
 {
     const pugi::xml_node element = cut("", {48000, 5000, 600, RegionEdge::New, RegionEdge::Old});
     EXPECT_STREQ(element.attribute("fade-in-active").value(), "1");
+}
+
+TEST_F(CutRegion, FadesAtANewEdgeAsLongAsTheUserWants)
+{
+    edgeFade = 480;
+    const pugi::xml_node element =
+        cut(fade("FadeIn", 800), {48000, 5000, 600, RegionEdge::New, RegionEdge::New}, "id=\"51\"");
+    EXPECT_EQ(lengthOf(element, "FadeIn"), 480);
+    EXPECT_EQ(lengthOf(element, "FadeOut"), 480);
+    EXPECT_EQ(lengthOf(element, "InverseFadeOut"), 480);
+    EXPECT_STREQ(element.attribute("default-fade-in").value(), "0");
+    EXPECT_STREQ(element.child("FadeOut").child("AutomationList").attribute("automation-id").value(), "fadeout");
+}
+
+TEST_F(CutRegion, HasNoFadeAtANewEdgeWhenTheUserWantsNone)
+{
+    edgeFade = 0;
+    const pugi::xml_node element = cut(fade("FadeIn", 800), {48000, 5000, 600, RegionEdge::New, RegionEdge::New});
+    EXPECT_STREQ(element.attribute("fade-in-active").value(), "0");
+    EXPECT_STREQ(element.attribute("fade-out-active").value(), "0");
 }
 
 TEST_F(CutRegion, HasNoFadeAtASeam)
