@@ -73,7 +73,7 @@ SessionId idOf(const pugi::xml_node& node)
 {
     const std::optional<SessionId> id = idIn(node.attribute("id").value());
     if (!id)
-        throw FileFault(node.name(), "has the id " + quoted(node.attribute("id").value()) + ", which is none");
+        throw FileFault(quoted(node.name()), "has the id " + quoted(node.attribute("id").value()) + ", which is none");
     return *id;
 }
 
@@ -320,10 +320,14 @@ void ArdourReader::readRoute(const pugi::xml_node& route, Project& project)
         const std::optional<SessionId> playlistId = idIn(ownPlaylist.value());
         const auto playlist = playlistId ? m_playlists.find(*playlistId) : m_playlists.end();
         if (playlist == m_playlists.end())
-            throw FileFault(name, "plays the playlist " + quoted(ownPlaylist.value()) + ", which isn't there");
+            throw FileFault(quoted(std::string_view(name)),
+                            "plays the playlist " + quoted(ownPlaylist.value()) + ", which isn't there");
         // One that tracks share moves once.
-        if (m_playlistsRead.insert(*playlistId).second)
+        if (m_playlistsRead.insert(*playlistId).second) {
             readPlaylist(id, playlist->second, *track);
+            // The elements of long playlists take more memory than all else together.
+            playlist->second.parent().remove_child(playlist->second);
+        }
     }
     const bool hasPoints = std::ranges::any_of(track->curves(), [](const auto& c) { return c.second->firstChild(); });
     if (ownPlaylist || hasPoints)
@@ -353,7 +357,7 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
     if (clock.hasUnits()) {
         const std::size_t at = length.find('@');
         if (at == length.npos)
-            throw FileFault(name, "has the length " + quoted(length) + ", which is none");
+            throw FileFault(quoted(std::string_view(name)), "has the length " + quoted(length) + ", which is none");
         read.position = clock.samples(length.substr(at + 1));
         read.length = clock.endInSamples(length.substr(at + 1), length.substr(0, at)) - read.position;
     } else {
@@ -362,7 +366,8 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
     }
     read.start = clock.samples(region.attribute("start").value());
     if (!m_session.regions.emplace(id, read).second)
-        throw FileFault(name, "has the id " + std::to_string(id) + ", which is another region's");
+        throw FileFault(quoted(std::string_view(name)),
+                        "has the id " + std::to_string(id) + ", which is another region's");
 
     const auto clip = m_clips.find(idIn(region.attribute("source-0").value()).value_or(-1));
     if (clip == m_clips.end()) {
@@ -473,7 +478,7 @@ void ArdourReader::readLocations(Project& project)
         read.start = clock.samples(location.attribute("start").value());
         read.end = read.isRange ? clock.samples(location.attribute("end").value()) : read.start;
         if (read.end < read.start)
-            throw FileFault(read.name, "ends before it begins");
+            throw FileFault(quoted(std::string_view(read.name)), "ends before it begins");
         if (hasFlag(flags, "IsSessionRange")) {
             m_session.sessionRange = read;
             project.setProjectEnd(clock.secondsOf(read.end));

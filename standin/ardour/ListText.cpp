@@ -52,10 +52,10 @@ std::vector<ListPoint> readPoints(const pugi::xml_node& list, const SessionClock
     for (std::string_view time = takeWord(text); !time.empty(); time = takeWord(text)) {
         const std::optional<double> value = numberIn(takeWord(text));
         if (!value)
-            throw FileFault(name, "has a point without a value");
+            throw FileFault(quoted(std::string_view(name)), "has a point without a value");
         const double seconds = clock.seconds(time);
         if (!points.empty() && seconds < points.back().seconds)
-            throw FileFault(name, "has points that don't follow one another");
+            throw FileFault(quoted(std::string_view(name)), "has points that don't follow one another");
         points.push_back({seconds, *value, SessionClock::isMusical(time)});
     }
     return points;

@@ -111,15 +111,18 @@ std::string TextPatch::result()
     std::ranges::stable_sort(m_edits, {}, [](const Edit& edit) { return edit.range.begin; });
     std::size_t size = m_text.size();
     for (const Edit& edit : m_edits)
-        size += edit.text.size();
+        size += edit.text.size() - (edit.range.end - edit.range.begin);
     std::string result;
     result.reserve(size);
     std::size_t at = 0;
-    for (const Edit& edit : m_edits) {
-        result.append(m_text.substr(at, edit.range.begin - at)).append(edit.text);
+    for (Edit& edit : m_edits) {
+        // A long session is there in memory once, and not in pieces as well.
+        const std::string text = std::move(edit.text);
+        result.append(m_text.substr(at, edit.range.begin - at)).append(text);
         at = edit.range.end;
     }
-    return result.append(m_text.substr(at));
+    result.append(m_text.substr(at));
+    return result;
 }
 
 } // namespace standin
