@@ -1,16 +1,16 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/ProjectReader.h"
+#include "standin/stage/ProjectReader.h"
 
 #include "standin/base/AttributeList.h"
 #include "standin/base/Utf16.h"
-#include "standin/file/Base64.h"
-#include "standin/file/FileFault.h"
 #include "standin/project/ClipEvent.h"
+#include "standin/project/FileFault.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
+#include "standin/stage/Base64.h"
 
 #include <limits>
 #include <optional>

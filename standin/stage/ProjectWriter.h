@@ -3,9 +3,10 @@
 #pragma once
 
 #include "standin/base/Attribute.h"
-#include "standin/file/JsonWriter.h"
-#include "standin/file/ProjectKeys.h"
+#include "standin/stage/JsonWriter.h"
+#include "standin/stage/ProjectKeys.h"
 
+#include <functional>
 #include <string>
 #include <string_view>
 
@@ -29,8 +30,13 @@ public:
     /// interfaces can bring that about.
     static std::string textOf(const Project& project);
 
+    /// Which clips, tracks, curves and events a text has. What isn't written has nothing of what is in it written either.
+    using Choice = std::function<bool(const Node&)>;
+    /// The text of a project that has only these. What is written must not need what isn't.
+    static std::string textOf(const Project& project, const Choice& isWritten);
+
 private:
-    explicit ProjectWriter(const Project& project) : m_project(project) {}
+    ProjectWriter(const Project& project, const Choice& isWritten) : m_project(project), m_isWritten(isWritten) {}
 
     void writeProject();
     void writeClock();
@@ -63,6 +69,7 @@ private:
     [[noreturn]] void refuse(const std::string& fault) const;
 
     const Project& m_project;
+    const Choice& m_isWritten;
     JsonWriter m_json;
     int m_depth = 0; ///< of containers in one another
 };

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/FileFault.h"
+#include "standin/project/FileFault.h"
 
 #include "util/JsonText.h"
 

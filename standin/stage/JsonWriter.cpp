@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/JsonWriter.h"
+#include "standin/stage/JsonWriter.h"
 
-#include "standin/file/FileFault.h"
-#include "standin/file/JsonDocument.h"
+#include "standin/project/FileFault.h"
+#include "standin/stage/JsonDocument.h"
 #include "util/JsonText.h"
 
 #include <algorithm>

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/JsonMembers.h"
+#include "standin/stage/JsonMembers.h"
 
-#include "standin/file/FileFault.h"
+#include "standin/project/FileFault.h"
 #include "standin/project/Project.h"
 #include "util/JsonText.h"
 

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/JsonDocument.h"
+#include "standin/stage/JsonDocument.h"
 
-#include "standin/file/FileFault.h"
+#include "standin/project/FileFault.h"
 #include "util/JsonText.h"
 
 #include <nlohmann/json.hpp>

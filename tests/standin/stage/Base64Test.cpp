@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/Base64.h"
+#include "standin/stage/Base64.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>

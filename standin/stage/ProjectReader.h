@@ -2,8 +2,8 @@
 
 #pragma once
 
-#include "standin/file/JsonMembers.h"
-#include "standin/file/ProjectKeys.h"
+#include "standin/stage/JsonMembers.h"
+#include "standin/stage/ProjectKeys.h"
 #include "velmark/Counted.h"
 
 #include <string>

@@ -2,8 +2,8 @@
 
 #pragma once
 
-#include "standin/file/JsonDocument.h"
-#include "standin/file/ProjectKeys.h"
+#include "standin/stage/JsonDocument.h"
+#include "standin/stage/ProjectKeys.h"
 
 #include <cstddef>
 #include <cstdint>

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/JsonWriter.h"
+#include "standin/stage/JsonWriter.h"
 
-#include "standin/file/JsonDocument.h"
+#include "standin/stage/JsonDocument.h"
 
 #include <gtest/gtest.h>
 

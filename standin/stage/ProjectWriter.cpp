@@ -1,18 +1,18 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "standin/file/ProjectWriter.h"
+#include "standin/stage/ProjectWriter.h"
 
 #include "standin/base/AttributeList.h"
 #include "standin/base/Text.h"
 #include "standin/base/Utf16.h"
-#include "standin/file/Base64.h"
-#include "standin/file/FileFault.h"
-#include "standin/file/JsonDocument.h"
 #include "standin/project/ClipEvent.h"
+#include "standin/project/FileFault.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
+#include "standin/stage/Base64.h"
+#include "standin/stage/JsonDocument.h"
 
 #include <algorithm>
 
@@ -30,10 +30,12 @@ using Layout = JsonWriter::Layout;
 constexpr double AnyTime = -FurthestTime;
 
 template <class Child, class Visit>
-void forEachChild(const Container& container, Visit visit)
+void forEachChild(const Container& container, const ProjectWriter::Choice& isWritten, Visit visit)
 {
-    for (const Node* child = container.firstChild(); child; child = container.childBehind(*child))
-        visit(static_cast<const Child&>(*child));
+    for (const Node* child = container.firstChild(); child; child = container.childBehind(*child)) {
+        if (isWritten(*child))
+            visit(static_cast<const Child&>(*child));
+    }
 }
 
 std::string_view kindOf(const Event& event)
@@ -73,7 +75,12 @@ bool isWorthStoring(const Envelope& curve, const Track& newTrack)
 
 std::string ProjectWriter::textOf(const Project& project)
 {
-    ProjectWriter writer(project);
+    return textOf(project, [](const Node&) { return true; });
+}
+
+std::string ProjectWriter::textOf(const Project& project, const Choice& isWritten)
+{
+    ProjectWriter writer(project, isWritten);
     writer.writeProject();
     std::string text = writer.m_json.takeText();
     if (text.size() > JsonDocument::LargestSize)
@@ -119,8 +126,10 @@ void ProjectWriter::writePool()
 {
     m_json.key(Key::Pool);
     m_json.beginList();
-    for (const auto& [number, clip] : m_project.pool().clips())
-        writeClip(*clip);
+    for (const auto& [number, clip] : m_project.pool().clips()) {
+        if (m_isWritten(*clip))
+            writeClip(*clip);
+    }
     m_json.endList();
 }
 
@@ -141,7 +150,7 @@ void ProjectWriter::writeTracks(const Container& parent)
 {
     m_json.key(Key::Tracks);
     m_json.beginList();
-    forEachChild<Track>(parent, [this](const Track& track) { writeTrack(track); });
+    forEachChild<Track>(parent, m_isWritten, [this](const Track& track) { writeTrack(track); });
     m_json.endList();
 }
 
@@ -168,7 +177,9 @@ void ProjectWriter::writeCurves(const Track& track)
     if (!track.hasAutomation())
         return;
     const Counted<Track> newTrack = Track::create(track.kind());
-    const auto isStored = [&](const auto& curve) { return isWorthStoring(*curve.second, *newTrack); };
+    const auto isStored = [&](const auto& curve) {
+        return isWorthStoring(*curve.second, *newTrack) && m_isWritten(*curve.second);
+    };
     if (std::ranges::none_of(track.curves(), isStored))
         return;
     m_json.key(Key::Curves);
@@ -191,7 +202,7 @@ void ProjectWriter::writeCurve(const Envelope& curve)
     writeDetails(curve, what.empty() ? KnownKeys(NamelessCurveKeys) : CurveKeys, Layout::Lines);
     m_json.key(Key::Points);
     m_json.beginList();
-    forEachChild<AutomationPoint>(curve, [this](const AutomationPoint& point) { writePoint(point); });
+    forEachChild<AutomationPoint>(curve, m_isWritten, [this](const AutomationPoint& point) { writePoint(point); });
     m_json.endList();
     m_json.endObject();
 }
@@ -211,7 +222,7 @@ void ProjectWriter::writeEvents(const Container& container)
 {
     m_json.key(Key::Events);
     m_json.beginList();
-    forEachChild<Event>(container, [this](const Event& event) { writeEvent(event); });
+    forEachChild<Event>(container, m_isWritten, [this](const Event& event) { writeEvent(event); });
     m_json.endList();
 }
 
