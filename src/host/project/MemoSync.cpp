@@ -422,7 +422,7 @@ private:
                 found.push_back(memo);
             else if (!isBefore(memo.span.start, stretch.source.end) && wasHere(memo))
                 found.push_back(memo);
-            else
+            else if (reachesInto(memo.span, stretch.source) || !isBefore(memo.span.start, stretch.source.end))
                 reaching.push_back(memo);
         });
         if (reaching.empty())

@@ -527,6 +527,21 @@ TEST_P(MemoSyncTest, AMemoThatOnlyReachesInIsNoOther)
     EXPECT_EQ(film(), (Content{"in 2-12", "cue 15", "out 18-29"}));
 }
 
+TEST_P(MemoSyncTest, AMemoThatEndsWhereTheSourceBeginsIsNotTheOneOfACopyOfItsId)
+{
+    const auto cue = addMemo(u"cue", 18.0, 19.0);
+    preview({tenSeconds()});
+    unfollowed([&] {
+        paste(cue, 9.0, u"pasted");
+        remove(cue);
+        move(copyOf(u"cue"), 30.0);
+    });
+
+    addCopy(u"splash", 39.0);
+
+    EXPECT_EQ(memoOf(u"pasted")->getStart(nullptr), PreviewedMemos::film(9.0));
+}
+
 TEST_P(MemoSyncTest, AMemoAtTheEndOfTheSourceIsNotInThePreview)
 {
     addMemo(u"cue", 12.0);
