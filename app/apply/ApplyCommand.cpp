@@ -31,6 +31,7 @@
 #include "core/time/Timecode.h"
 #include "standin/base/Times.h"
 #include "standin/project/Project.h"
+#include "standin/project/ProjectForm.h"
 #include "util/Result.h"
 
 #include <algorithm>
@@ -341,6 +342,8 @@ public:
         const core::PastRuns runs = core::RunRecord::findOrGuess(model, lastAllowed);
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
+        if (const standin::ProjectForm* const form = hosted.project().form())
+            m_facts.staying = form->staying();
         m_facts.timeOrigin = hosted.project().timeOrigin();
         m_facts.cuts = source.cuts;
         m_facts.changeNames = source.files.names;
@@ -542,6 +545,13 @@ void print(const ApplyFacts& facts, const ProjectClock& clock, const ApplyNotes*
     flushStandardOutput();
 }
 
+void setFade(standin::Project& project, const ApplyOptions& options)
+{
+    if (!project.form())
+        throw Failure{options.projectFile, "has clips without fades", "leave --fade out"};
+    project.form()->setEdgeFade(*options.fade / 1000.0);
+}
+
 } // namespace
 
 void runApply(const ApplyOptions& options, Terminal& terminal)
@@ -555,6 +565,10 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     HostedProject hosted(options.projectFile, terminal, openingOf(options));
     const ProjectClock clock = clockOf(hosted.project(), options.projectFile);
     requireRate(options, clock);
+    if (!targetOf(options).empty())
+        hosted.requireTarget(targetOf(options));
+    if (options.fade)
+        setFade(hosted.project(), options);
     hosted.endPreview();
     if (options.isFresh)
         forgetStored(hosted.model());

@@ -24,6 +24,7 @@
 
 namespace cadrel::app {
 
+using standin::ProjectFile;
 using standin::ProjectFileChanged;
 using standin::ProjectFileError;
 using util::Result;
@@ -168,6 +169,15 @@ void HostedProject::apply(const std::function<Result::Type()>& request)
         throw Failure{m_file, *far + ", too far off for a run", "move it to its place, or remove it"};
     if (end.result() != Result::Ok)
         throw breakFailure(end.result(), m_file);
+}
+
+void HostedProject::requireTarget(const std::string& file) const
+{
+    try {
+        ProjectFile::requireWritable(*m_project, file);
+    } catch (const ProjectFileError& error) {
+        throw Failure{file, faultIn(error, file), "give another name"};
+    }
 }
 
 void HostedProject::save(const std::string& file, const std::optional<util::FileStamp>& expected)

@@ -52,6 +52,9 @@ public:
     /// The same, but nothing changes outside of the bounds, in seconds of the project's clock.
     void applyWithin(const core::SecondsRange& bounds);
 
+    /// Throws Failure where the project can't be written, as far as that is known before a run.
+    void requireTarget(const std::string& file) const;
+
     // The host's own save, in which the model is stored with the project. Each throws Failure, with all files as they were.
 
     /// Over the file that was read. Refused when another program has saved it since.

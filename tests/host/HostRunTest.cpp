@@ -486,6 +486,27 @@ TEST_P(HostRunTest, TellsWhatStandsOnTheTracksThatItChanges)
     EXPECT_EQ(material(), Material());
 }
 
+TEST_P(HostRunTest, TellsOfEveryKindOfThingThatARunTakesAway)
+{
+    host.addPart(track, u"part", host.inHost(30.0), host.inHost(35.0));
+    const auto picture = host.addTrack(TypeWord::Video, u"VIDEO");
+    host.addClip(picture, u"shot", host.inHost(40.0), host.inHost(45.0));
+    const auto markers = host.addTrack(TypeWord::Marker, u"Notes");
+    host.addPointMarker(markers, u"note", host.inHost(50.0));
+    host.addRangeMarker(markers, u"scene", host.inHost(52.0), host.inHost(58.0));
+    host.addPoint(track, standin::Envelope::Curve::Volume, host.inHost(60.0), 0.5F);
+
+    auto material = host.adapter().getMaterial();
+    std::ranges::sort(material, {}, &core::SecondsRange::start);
+    ASSERT_EQ(material.size(), 7U);
+    const std::vector<std::pair<double, double>> expected{{0, 10},  {10, 20}, {30, 35}, {40, 45},
+                                                          {50, 50}, {52, 58}, {60, 60}};
+    for (std::size_t index = 0; index < expected.size(); ++index) {
+        EXPECT_DOUBLE_EQ(material[index].start, AdaptedHost::onClock(expected[index].first)) << index;
+        EXPECT_DOUBLE_EQ(material[index].end, AdaptedHost::onClock(expected[index].second)) << index;
+    }
+}
+
 TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
 {
     // The second half of the film goes far behind its end, and no event makes the project end there.

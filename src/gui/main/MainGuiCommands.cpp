@@ -106,14 +106,18 @@ void MainGui::start()
         Guard::tell(EngineAnswers::ofReadiness(ready, ActionChangeContext::Run));
         return;
     }
+    m_hadFocus = hasKeyboardFocus(true);
+    const bool wasPreview = m_model->isPreviewActive();
     if (!stopPreview())
         return;
-    m_controls.setOn(MainButton::Source, true);
+    if (wasPreview)
+        m_controls.setOn(MainButton::Source, true);
     if (!mayRepeat())
         return;
-    const Protection protection = askForProtection();
+    core::ProtectedRun run = plannedRun();
+    const Protection protection = askForProtection(run);
     if (protection != Protection::None)
-        requestRun(protection);
+        requestRun(protection, run);
 }
 
 core::ProtectedRun MainGui::plannedRun() const
@@ -121,12 +125,29 @@ core::ProtectedRun MainGui::plannedRun() const
     return {*m_model, m_engine->getMaterial(), core::ProtectedRun::sourceOf(*m_model)};
 }
 
-MainGui::Protection MainGui::askForProtection()
+MainGui::Protection MainGui::askForProtection(core::ProtectedRun& run)
 {
-    const core::ProtectedRun run = plannedRun();
-    const KeepQuestion question(run, core::Timecode::framerate());
-    if (!question.isNeeded())
-        return Protection::Plain;
+    Protection answer = Protection::Plain;
+    std::wstring asked;
+    for (;;) {
+        const KeepQuestion question(run, core::Timecode::framerate());
+        const std::wstring text = question.text();
+        if (!question.isNeeded())
+            return Protection::Plain;
+        // The user has answered what is to be asked now.
+        if (text == asked)
+            return answer;
+        answer = answerTo(question);
+        if (answer == Protection::None)
+            return answer;
+        asked = text;
+        // List and material may have changed while he was asked.
+        run = plannedRun();
+    }
+}
+
+MainGui::Protection MainGui::answerTo(const KeepQuestion& question)
+{
     // The first button is the one that Return presses.
     using Answers = std::vector<std::pair<const wchar_t*, Protection>>;
     const Answers answers =
@@ -167,33 +188,38 @@ void MainGui::noteRun()
     core::RunRecord::addRun(*m_model, core::RunRecord::allowedBy(m_model->settings()));
 }
 
-void MainGui::requestRun(Protection protection)
+void MainGui::requestRun(Protection protection, const core::ProtectedRun& run)
 {
-    const bool hadFocus = hasKeyboardFocus(true);
-    Result::Type answer = Result::Ok;
-    if (protection == Protection::Kept) {
-        // While the user was asked, the list may have changed.
-        const core::ProtectedRun run = plannedRun();
-        if (!run.needsRun()) {
-            noteRun();
-            Guard::tell(translated(L"Everything stands where the new cut has it. Nothing has to change."));
-            return;
-        }
-        {
-            const auto command = core::createDataModelCommand(translated(L"Keep Sound outside of the Change EDL"));
-            run.putStartableListInto(*m_model);
-        }
-        answer = m_engine->startCadrelWithin(run.bounds());
-    } else {
-        answer = m_engine->startCadrel();
+    const bool isKept = protection == Protection::Kept;
+    if (isKept && !run.needsRun()) {
+        noteRun();
+        Guard::tell(translated(L"Everything stands where the new cut has it. Nothing has to change."));
+        return;
     }
+    const Result::Type answer = isKept ? requestKeptRun(run) : m_engine->startCadrel();
     if (answer != Result::Ok) {
         Guard::tell(EngineAnswers::ofRequest(answer, ActionChangeContext::Run));
         return;
     }
     m_isRunRequested = true;
-    m_hadFocus = hadFocus;
     updateEnablement();
+}
+
+/// The run begins later. So the list changes only when there will be a run.
+Result::Type MainGui::requestKeptRun(const core::ProtectedRun& run)
+{
+    const Result::Type answer = m_engine->startCadrelWithin(run.bounds());
+    if (answer != Result::Ok || run.source() == core::ProtectedRun::Source::Given)
+        return answer;
+    try {
+        const auto command = core::createDataModelCommand(translated(L"Keep Sound outside of the Change EDL"));
+        run.putStartableListInto(*m_model);
+    } catch (...) {
+        // That drops what is requested.
+        m_engine->setPreviewActive(false);
+        throw;
+    }
+    return answer;
 }
 
 // ---- The preview ---------------------------------------------------------------------------------------------------

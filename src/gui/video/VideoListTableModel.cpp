@@ -17,6 +17,7 @@ namespace {
 /// What a row keeps free beside its rule.
 constexpr int LeftEdge = 5;
 constexpr int BothEdges = 8;
+constexpr float SelectionOpacity = 0.35F;
 constexpr int NameFont = 5;
 constexpr int TimecodeFont = 7;
 constexpr float TextX = 18.0F;
@@ -296,6 +297,11 @@ std::unique_ptr<Input> VideoListTableModel::takeOrMake(juce::Component*& existin
 void VideoListTableModel::paintRowBackground(juce::Graphics& graphics, int row, int width, int height, bool isSelected)
 {
     guardSystem([&] {
+        if (isSelected) {
+            // Dark enough for the white digits of the start.
+            graphics.setColour(toColour(Palette::selection).withAlpha(SelectionOpacity));
+            graphics.fillRect(LeftEdge, 1, width - BothEdges, height - 1);
+        }
         if (row != 0) {
             graphics.setColour(toColour(Palette::band));
             graphics.drawHorizontalLine(0, static_cast<float>(LeftEdge), static_cast<float>(width - BothEdges));

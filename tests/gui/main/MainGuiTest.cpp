@@ -359,11 +359,9 @@ TEST_F(MainGuiTest, FollowsEachList)
     EXPECT_EQ(tableModel("Change").getNumRows(), 5);
 }
 
-TEST_F(MainGuiTest, IgnoresAListThatItDoesNotKnow)
+TEST_F(MainGuiTest, IgnoresAListWithoutAModel)
 {
     showThree();
-    notify(EventListChangeContext(3));
-    notify(EventListChangeContext(-1));
     deactivate();
     notify(EventListChangeContext(ListKind::Old));
 
@@ -1251,6 +1249,34 @@ protected:
         m_engine.material = {{3600, 3615}, {5 * 3600, 5 * 3600 + 60}};
         activate();
     }
+    /// Two shots, of which the first has lost its last two seconds, and a second of sound before them:
+    ///
+    ///     old    |-- A --|-- B --|       10 s each, from 01:00:00:00
+    ///     new    |- A -|-- B --|
+    void showGenerated()
+    {
+        const auto addShots = [](core::EventList& cut, const char* endOfA, const char* between, const char* end) {
+            cut.add(makeEvent("A001", "10:00:00:00", endOfA, "01:00:00:00", between));
+            cut.add(makeEvent("B002", "12:00:00:00", "12:00:10:00", between, end));
+        };
+        addShots(list(ListKind::Old), "10:00:10:00", "01:00:10:00", "01:00:20:00");
+        addShots(list(ListKind::New), "10:00:08:00", "01:00:08:00", "01:00:18:00");
+        ASSERT_EQ(m_model.generateChangeEdl(), Result::Ok);
+        ASSERT_EQ(list(ListKind::Change).size(), 2U);
+        m_engine.material = {{3598, 3599}};
+        activate();
+    }
+    /// A shot that comes to stand eight seconds later, close to midnight, and sound hours before.
+    void showLateReel()
+    {
+        list(ListKind::Old).add(makeEvent("A001", "10:00:00:00", "10:00:10:00", "23:59:40:00", "23:59:50:00"));
+        list(ListKind::New).add(makeEvent("A001", "10:00:00:00", "10:00:10:00", "23:59:48:00", "23:59:58:00"));
+        ASSERT_EQ(m_model.generateChangeEdl(), Result::Ok);
+        m_engine.material = {{12 * 3600, 12 * 3600 + 1}};
+        activate();
+    }
+    /// Sound after the late reel, which would move with it, out of the day.
+    void addSoundAtMidnight() { m_engine.material.push_back({24 * 3600 - 6, 24 * 3600 - 4}); }
 };
 
 TEST_F(MainGuiProtectionTest, StartsARunThatTakesNothingAwayWithoutAQuestion)
@@ -1272,7 +1298,9 @@ TEST_F(MainGuiProtectionTest, KeepsWhatTheListDoesNotCarryUnlessTheUserWantsOthe
     EXPECT_EQ(m_alerts.messages[0].substr(0, 11), L"00:01:00:00");
     EXPECT_EQ(m_alerts.buttons[0], (Texts{L"Keep", L"Don't Keep", L"Cancel"}));
     EXPECT_EQ(m_engine.calls, Calls{"run 3600..3625"});
-    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
+    // The list stays as it is, so that there is nothing to undo.
+    EXPECT_EQ(m_undo.begun, Texts());
+    EXPECT_EQ(list(ListKind::Change).size(), 1U);
     EXPECT_FALSE(m_gui->isEnabled());
 }
 
@@ -1294,6 +1322,7 @@ TEST_F(MainGuiProtectionTest, StartsNoRunWhenTheUserCancelsOrClosesTheQuestion)
         click("Cadrel Button");
     }
 
+    EXPECT_EQ(m_alerts.messages.size(), 3U);
     EXPECT_EQ(m_engine.calls, Calls());
     EXPECT_EQ(m_undo.begun, Texts());
     EXPECT_TRUE(m_gui->isEnabled());
@@ -1311,7 +1340,91 @@ TEST_F(MainGuiProtectionTest, StartsNoRunWhenTheProjectGoesDuringTheQuestion)
     m_engine.ready = Result::Ok;
     click("Cadrel Button");
 
+    EXPECT_EQ(m_alerts.messages.size(), 3U);
     EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiProtectionTest, PutsAListThatKeepsAllInThePlaceOfAGeneratedOne)
+{
+    showGenerated();
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_engine.calls, Calls{"run 3608..3620"});
+    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
+    ASSERT_EQ(list(ListKind::Change).size(), 1U);
+    EXPECT_EQ(list(ListKind::Change).at(0).rollName(), "B002");
+}
+
+TEST_F(MainGuiProtectionTest, LeavesAGeneratedListAsItIsWhenTheRunIsRefused)
+{
+    showGenerated();
+    m_engine.answer = Result::HostCallFailed;
+    click("Cadrel Button");
+
+    EXPECT_EQ(list(ListKind::Change).size(), 2U);
+    EXPECT_EQ(m_undo.begun, Texts());
+    EXPECT_EQ(m_alerts.messages.back(), L"The workstation has refused this. Check that no track is locked.");
+    EXPECT_TRUE(m_gui->isEnabled());
+}
+
+TEST_F(MainGuiProtectionTest, DropsTheRunWhoseListCannotBeMade)
+{
+    showGenerated();
+    m_undo.failure = Result::HostCallFailed;
+    click("Cadrel Button");
+
+    EXPECT_EQ(list(ListKind::Change).size(), 2U);
+    EXPECT_EQ(m_engine.calls, (Calls{"run 3608..3620", "off"}));
+    EXPECT_EQ(m_alerts.messages.back(), L"The workstation has refused this. Check that no track is locked.");
+    EXPECT_TRUE(m_gui->isEnabled());
+}
+
+TEST_F(MainGuiProtectionTest, AsksAgainWhenThereIsMoreToKeepAfterTheQuestion)
+{
+    showGivenList();
+    m_alerts.meanwhile = [this] { m_engine.material.push_back({6 * 3600, 6 * 3600 + 30}); };
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 2U);
+    EXPECT_EQ(m_alerts.messages[0].substr(0, 11), L"00:01:00:00");
+    EXPECT_EQ(m_alerts.messages[1].substr(0, 11), L"00:01:30:00");
+    EXPECT_EQ(m_engine.calls, Calls{"run 3600..3625"});
+}
+
+TEST_F(MainGuiProtectionTest, StartsAPlainRunWhenThereIsNothingLeftToKeepAfterTheQuestion)
+{
+    showGivenList();
+    m_alerts.meanwhile = [this] { m_engine.material.pop_back(); };
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+}
+
+TEST_F(MainGuiProtectionTest, AsksAgainWhenNothingCanBeKeptAfterTheQuestion)
+{
+    showLateReel();
+    m_alerts.meanwhile = [this] { addSoundAtMidnight(); };
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 2U);
+    EXPECT_NE(m_alerts.messages[1].find(L"It can't be kept"), std::wstring::npos);
+    // The first button of the second question is the one that changes nothing.
+    EXPECT_EQ(m_alerts.buttons[1], (Texts{L"Cancel", L"Don't Keep"}));
+    EXPECT_EQ(m_engine.calls, Calls());
+    EXPECT_EQ(list(ListKind::Change).size(), 1U);
+}
+
+TEST_F(MainGuiProtectionTest, OffersToLeaveItWhereNothingCanBeKept)
+{
+    showLateReel();
+    addSoundAtMidnight();
+    m_alerts.answer = 2;
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_alerts.buttons.at(0), (Texts{L"Cancel", L"Don't Keep"}));
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
 }
 
 TEST_F(MainGuiProtectionTest, StartsNoRunWhenItCannotLookAtTheProject)
