@@ -15,6 +15,7 @@
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
 #include "host/undo/PreviewEventsStep.h"
+#include "host/undo/RunNoteStep.h"
 #include "host/video/ProjectVideo.h"
 #include "host/video/VideoWriting.h"
 #include "util/FilledText.h"
@@ -214,8 +215,7 @@ Result::Type Host::runCadrel()
             double end = 0.0;
             project.getApplyRange(start, end);
             project.closeRange(isOnlySelected(project.model().settings()), start, end);
-            requireActive(project);
-            core::RunRecord::addRun(project.model(), allowed);
+            noteRun(project, allowed, transaction);
         });
         requireSuccess(result);
         if (actions) {
@@ -225,6 +225,17 @@ Result::Type Host::runCadrel()
         tellOfVideo(video);
         tellOfLeftOut(project);
     });
+}
+
+/// The note has a step of its own, as nobody hears where the host refuses that of the model.
+void Host::noteRun(Project& project, const core::FrameRange& allowed, IEditTransaction& transaction)
+{
+    requireActive(project);
+    const std::optional<Document> document = activeDocument();
+    if (!document)
+        throw Result::NoProject;
+    requireOk(transaction.addStep(makeCounted<RunNoteStep>(document->model).get()));
+    core::RunRecord::addRun(*document->model, allowed);
 }
 
 Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,

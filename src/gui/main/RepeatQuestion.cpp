@@ -31,8 +31,7 @@ std::wstring RepeatQuestion::text(const core::DataModel& model)
         return {};
     const core::NextRun next(model, core::ProtectedRun::sourceOf(model));
     if (const auto difference = next.firstDifference(*runs))
-        return util::filled(translated(L"The Old EDL isn't the cut of the last run. The sound stands in another cut, "
-                                       L"which differs from it first at %s."),
+        return util::filled(translated(L"The Old EDL isn't the cut of the last run. They differ first at %s."),
                             timecodeText(*difference)) +
                L"\n" + translated(L"If you start anyway, sound may come to stand in the wrong place.");
     if (next.hasBeenDone(*runs))

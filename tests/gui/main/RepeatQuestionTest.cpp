@@ -65,8 +65,7 @@ TEST_F(RepeatQuestionTest, TellsWhereTheSoundStandsInAnotherCut)
     run();
 
     EXPECT_EQ(text(m_model),
-              std::wstring(L"The Old EDL isn't the cut of the last run. The sound stands in another cut, "
-                           L"which differs from it first at 01:00:08:00.") +
+              std::wstring(L"The Old EDL isn't the cut of the last run. They differ first at 01:00:08:00.") +
                   Consequence);
 }
 
