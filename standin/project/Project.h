@@ -51,7 +51,7 @@ public:
 
     /// Where it is stored; empty for a project that never was.
     const std::u16string& path() const { return m_path; }
-    void setPath(std::u16string path) { m_path = std::move(path); }
+    void setPath(std::u16string path);
     const Velmark::FrameRateInfo& frameRate() const { return m_frameRate; }
     void setFrameRate(const Velmark::FrameRateInfo& info);
     double timeOrigin() const { return m_timeOrigin; }
