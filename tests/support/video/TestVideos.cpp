@@ -3,11 +3,14 @@
 #include "tests/support/video/TestVideos.h"
 
 #include "examples/burnin/VideoEncoding.h"
+#include "tests/support/TempFolder.h"
 #include "tests/support/TreePaths.h"
 
 #include <chrono>
 #include <cmath>
+#include <cstdlib>
 #include <functional>
+#include <stdexcept>
 #include <string>
 
 #include <unistd.h>
@@ -51,6 +54,21 @@ void make(const fs::path& file, const VideoRecipe& recipe)
     encoding.finish();
 }
 
+/// The file of that name that was made of what `whole` tells, made now if it isn't there.
+fs::path kept(const std::string& whole, const std::string& name, const std::function<void(const fs::path&)>& makeFile)
+{
+    const fs::path folder = fs::path(cadrel::tests::programPath("../test-videos")).lexically_normal();
+    fs::create_directories(folder);
+    const fs::path file = folder / (std::to_string(std::hash<std::string>()(whole)) + "-" + name);
+    if (fs::exists(file))
+        return file;
+    // Another test may make it at the same time: whoever comes last replaces it with the same.
+    const fs::path unfinished = folder / (std::to_string(getpid()) + "-" + file.filename().string());
+    makeFile(unfinished);
+    fs::rename(unfinished, file);
+    return file;
+}
+
 } // namespace
 
 fs::path videoOf(const VideoRecipe& recipe)
@@ -58,16 +76,21 @@ fs::path videoOf(const VideoRecipe& recipe)
     const std::string whole = recipe.options + '\n' + recipe.rate + '\n' + std::to_string(recipe.frames) + '\n' +
                               std::to_string(recipe.width) + 'x' + std::to_string(recipe.height) + '\n' +
                               std::to_string(RecipeVersion);
-    const fs::path folder = fs::path(cadrel::tests::programPath("../test-videos")).lexically_normal();
-    fs::create_directories(folder);
-    const fs::path file = folder / (std::to_string(std::hash<std::string>()(whole)) + "-" + recipe.name);
-    if (fs::exists(file))
-        return file;
-    // Another test may make it at the same time: whoever comes last replaces it with the same.
-    const fs::path unfinished = folder / (std::to_string(getpid()) + "-" + file.filename().string());
-    make(unfinished, recipe);
-    fs::rename(unfinished, file);
-    return file;
+    return kept(whole, recipe.name, [&recipe](const fs::path& file) { make(file, recipe); });
+}
+
+fs::path reel3VideoOf(const std::string& cut)
+{
+    const std::string program = cadrel::tests::programPath("render_reel3");
+    const std::string edl = cadrel::tests::treePath("examples/reel3/reel3_" + cut + ".edl");
+    const auto render = [&](const fs::path& file) {
+        std::string command;
+        for (const std::string& word : {program, edl, file.string()})
+            command += cadrel::examples::shellWord(word) + " ";
+        if (std::system(command.c_str()) != 0)
+            throw std::runtime_error("can't render " + edl);
+    };
+    return kept(cadrel::tests::contentOf(program) + cadrel::tests::contentOf(edl), "LW_R3_" + cut + ".mov", render);
 }
 
 int numberIn(const Picture& picture)

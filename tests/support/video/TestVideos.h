@@ -23,6 +23,9 @@ struct VideoRecipe {
 /// The path of the video, which is made when there is none of that recipe yet. It stays in the build folder.
 std::filesystem::path videoOf(const VideoRecipe& recipe);
 
+/// A cut of the example reel, "v07" or "v12", rendered as its videos are. It stays in the build folder, too.
+std::filesystem::path reel3VideoOf(const std::string& cut);
+
 /// The number that the bars of a picture show; -1 when they aren't black and white, or there is no picture.
 int numberIn(const Picture& picture);
 
