@@ -2,12 +2,11 @@
 
 #include "standin/video/PictureReader.h"
 
+#include "standin/video/MediaOpening.h"
 #include "standin/video/VideoError.h"
 
 #include <algorithm>
 #include <limits>
-#include <string>
-#include <system_error>
 #include <vector>
 
 namespace standin {
@@ -21,17 +20,6 @@ namespace {
 constexpr std::int64_t NoTime = AV_NOPTS_VALUE;
 /// How far the search for a last picture goes back at first, in seconds.
 constexpr int FirstStep = 1;
-
-void requireRegularFile(const fs::path& file)
-{
-    std::error_code error;
-    const fs::file_status status = fs::status(file, error);
-    if (!fs::exists(status))
-        throw VideoError(Reason::Missing);
-    // The reader would wait for what comes through a pipe or a device.
-    if (!fs::is_regular_file(status))
-        throw VideoError(Reason::Broken);
-}
 
 AvOwner<AVDictionary> decoderOptions()
 {
@@ -56,9 +44,6 @@ bool isPositive(AVRational ratio)
 
 PictureReader::PictureReader(const fs::path& file, Deadline deadline) : m_file(file), m_deadline(deadline)
 {
-    requireRegularFile(file);
-    // What the libraries write to the terminal is of no use to anybody.
-    av_log_set_level(AV_LOG_QUIET);
     open();
 }
 
@@ -70,19 +55,7 @@ void PictureReader::open()
     restart();
     m_waitsForKey = false;
 
-    AVFormatContext* const format = owned(avformat_alloc_context()).release();
-    format->interrupt_callback = {[](void* reader) { return static_cast<PictureReader*>(reader)->isLate() ? 1 : 0; },
-                                  this};
-    AVDictionary* options = nullptr;
-    av_dict_set(&options, "protocol_whitelist", "file", 0);
-    AVFormatContext* opened = format;
-    // The name of the protocol keeps a colon in the path from being read as one. What fails to open is freed.
-    const int error =
-        avformat_open_input(&opened, ("file:" + fs::absolute(m_file).string()).c_str(), nullptr, &options);
-    av_dict_free(&options);
-    if (error < 0)
-        fail(error);
-    m_format.reset(opened);
+    m_format = openMedia(m_file, m_deadline);
     refuseTooLarge();
 
     // The libraries take an array of bare dictionaries, one for each stream that is known so far.
@@ -93,7 +66,7 @@ void PictureReader::open()
     for (AVDictionary* dictionary : perStream)
         av_dict_free(&dictionary);
     if (found < 0)
-        fail(found);
+        throwFailure(m_deadline);
     openDecoder();
 }
 
@@ -111,14 +84,14 @@ void PictureReader::openDecoder()
     if (!codec || !isPositive(m_stream->time_base))
         throw VideoError(Reason::Broken);
     m_decoder = owned(avcodec_alloc_context3(codec));
-    if (const int error = avcodec_parameters_to_context(m_decoder.get(), &parameters); error < 0)
-        fail(error);
+    if (avcodec_parameters_to_context(m_decoder.get(), &parameters) < 0)
+        throwFailure(m_deadline);
     m_decoder->pkt_timebase = m_stream->time_base;
     AVDictionary* options = decoderOptions().release();
     const int error = avcodec_open2(m_decoder.get(), codec, &options);
     av_dict_free(&options);
     if (error < 0)
-        fail(error);
+        throwFailure(m_deadline);
 
     const AVRational guessed = av_guess_frame_rate(m_format.get(), m_stream, nullptr);
     const double rate = isPositive(guessed) ? std::clamp(av_q2d(guessed), 0.001, 1000.0) : 25.0;
@@ -311,13 +284,6 @@ bool PictureReader::isWithoutKeyBetween(std::int64_t first, std::int64_t second)
         return false;
     // An index that is made while the file is read ends where nobody has read yet.
     return keyBeside(0) != nullptr;
-}
-
-void PictureReader::fail(int error) const
-{
-    if (error == AVERROR(ENOMEM))
-        throw std::bad_alloc();
-    throw VideoError(isLate() ? Reason::TooSlow : Reason::Broken);
 }
 
 } // namespace standin

@@ -4,6 +4,7 @@
 
 #include "standin/video/Av.h"
 #include "standin/video/FrameClock.h"
+#include "standin/video/VideoError.h"
 
 #include <chrono>
 #include <cstdint>
@@ -11,8 +12,6 @@
 #include <optional>
 
 namespace standin {
-
-using Deadline = std::chrono::steady_clock::time_point;
 
 /// Decodes the pictures of a video one after the other, from the start of the file or from a place that it was set to. Reads
 /// files of this machine alone and decodes on the thread that calls. Everything may throw VideoError.
@@ -75,7 +74,6 @@ private:
     std::int64_t toldLength() const;
     Tail readTail();
     std::int64_t decodeTail();
-    [[noreturn]] void fail(int error) const;
 
     std::filesystem::path m_file;
     Deadline m_deadline;

@@ -11,6 +11,8 @@ const char* VideoError::what() const noexcept
         return "The file is missing.";
     case Reason::NoPicture:
         return "The file has no picture.";
+    case Reason::NoSound:
+        return "The file has no sound.";
     case Reason::Broken:
         return "The file is broken here.";
     case Reason::TooLarge:

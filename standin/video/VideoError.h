@@ -2,9 +2,13 @@
 
 #pragma once
 
+#include <chrono>
 #include <exception>
 
 namespace standin {
+
+/// When work on a file has to be done.
+using Deadline = std::chrono::steady_clock::time_point;
 
 /// Why there is no picture.
 class VideoError : public std::exception {
@@ -12,6 +16,7 @@ public:
     enum class Reason {
         Missing,    ///< there is no such file
         NoPicture,  ///< the file has none
+        NoSound,    ///< likewise
         Broken,     ///< the file or this part of it can't be read
         TooLarge,   ///< the picture has more pixels than are read
         TooSlow,    ///< it wasn't there in time
