@@ -5,6 +5,7 @@
 #include "app/CommandLine.h"
 #include "app/console/Program.h"
 #include "app/console/Terminal.h"
+#include "app/project/ProjectAccess.h"
 
 #include <optional>
 
@@ -16,7 +17,7 @@ using app::Terminal;
 
 void run(int argc, char** argv, Terminal& terminal)
 {
-    const std::optional<CommandLine> line = CommandLine::parse(argc, argv);
+    std::optional<CommandLine> line = CommandLine::parse(argc, argv);
     if (!line)
         return;
     switch (line->command) {
@@ -24,6 +25,7 @@ void run(int argc, char** argv, Terminal& terminal)
         app::runGenerate(line->generate, terminal);
         break;
     case CommandLine::Command::Apply:
+        line->apply.projectFile = app::projectFileIn(line->apply.projectFile);
         app::runApply(line->apply, terminal);
         break;
     case CommandLine::Command::Notes:
@@ -33,6 +35,7 @@ void run(int argc, char** argv, Terminal& terminal)
         app::runList(line->list, terminal);
         break;
     case CommandLine::Command::Show:
+        line->show.projectFile = app::projectFileIn(line->show.projectFile);
         app::runShow(line->show, terminal);
         break;
     }

@@ -17,17 +17,12 @@ namespace cadrel::app {
 
 using standin::ProjectFileError;
 
-namespace {
-
-/// The fault alone: the error begins with the name of the file, in as many bytes, as a failure does.
 std::string faultIn(const ProjectFileError& error, const std::string& file)
 {
     const std::string text = error.what();
     const bool hasName = text.size() > file.size() && text.compare(file.size(), 2, ": ") == 0;
     return hasName ? text.substr(file.size() + 2) : text;
 }
-
-} // namespace
 
 void requireReadableProject(const std::string& file)
 {
@@ -51,6 +46,15 @@ standin::Project& readProject(const std::string& file, Terminal& terminal)
         throw readingFailure(error, file);
     }
     return *project;
+}
+
+std::string projectFileIn(const std::string& path)
+{
+    try {
+        return standin::ProjectFile::fileIn(path).string();
+    } catch (const ProjectFileError& error) {
+        throw Failure{path, faultIn(error, path), "name the project's file"};
+    }
 }
 
 Failure readingFailure(const ProjectFileError& error, const std::string& file)
