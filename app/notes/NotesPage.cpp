@@ -68,7 +68,7 @@ ol.largest a { color: inherit; }
   .steps th:nth-child(5), .steps th:nth-child(6) { width: 112px; } .steps td, .steps th { padding-left: 6px; padding-right: 6px; } }
 @media screen and (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
 @media screen and (max-width: 900px) { .steps, .steps tbody { display: block; } .steps thead { display: none; }
-  .steps tr { display: grid; grid-template-columns: 34px auto 1fr auto auto; column-gap: 14px; padding: 6px 0; border-bottom: 1px solid var(--line); }
+  .steps tr { display: grid; grid-template-columns: 34px 106px 1fr auto auto; column-gap: 14px; padding: 6px 0; border-bottom: 1px solid var(--line); }
   .steps td, .steps tr.k td { padding: 0; border: 0; } .steps td:nth-child(5) { grid-area: 1 / 4; } .steps td:nth-child(6) { grid-area: 1 / 5; }
   .steps td:nth-child(4) { grid-column: 3 / 6; } }
 @media screen and (max-width: 600px) { .steps tr { grid-template-columns: 28px 1fr auto auto; column-gap: 10px; }
@@ -78,10 +78,11 @@ ol.largest a { color: inherit; }
   .tools { margin: 4px 0; font-size: 8pt; } .tools button, .tools span, .tools input, .tools label:has(input:not(:checked)) { display: none; }
   * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2, h2 + p, thead { break-after: avoid; }
   .steps { min-width: 0; } .steps th:nth-child(1) { width: 40px; } .steps th:nth-child(2) { width: 84px; }
-  .steps th:nth-child(3) { width: 210px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 90px; }
+  .steps th:nth-child(3) { width: 150px; } .steps td:nth-child(3) { white-space: normal; }
+  .steps th:nth-child(5), .steps th:nth-child(6) { width: 88px; }
   svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } th { font-size: 8pt; } td.tc { font-size: 8pt; }
   tr.k td { font-size: 7.5pt; } .tag { font-size: 7.5pt; } ol.largest, details.sound { font-size: 8pt; } details.sound .tc { font-size: 7.5pt; }
-  details.sound ul { margin: 1px 0 2px; } }
+  details.sound ul { margin: 1px 0 2px; padding-left: 6px; } }
 )";
 
 const std::string_view NotesPage::Script = R"(
