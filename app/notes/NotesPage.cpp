@@ -63,7 +63,7 @@ details.sound .tc { display: inline-block; min-width: 8.5em; font: 12.5px ui-mon
 ol.largest { columns: 2; column-gap: 40px; padding-left: 24px; margin: 8px 0; font-size: 14px; }
 ol.largest a { color: inherit; }
 [hidden] { display: none !important; }
-@media screen and (max-width: 1000px) { .steps { min-width: 0; } .steps th:nth-child(1) { width: 44px; }
+@media screen and (max-width: 1040px) { .steps { min-width: 0; } .steps th:nth-child(1) { width: 44px; }
   .steps th:nth-child(3) { width: 184px; } .steps td:nth-child(3) { white-space: normal; }
   .steps th:nth-child(5), .steps th:nth-child(6) { width: 112px; } .steps td, .steps th { padding-left: 6px; padding-right: 6px; } }
 @media screen and (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }

@@ -188,6 +188,21 @@ TEST(ApplyNotes, TheHealingIsThatOfTheChangeEdlThatWasApplied)
     EXPECT_FALSE(tells(text, "For the change EDL")) << text;
 }
 
+TEST(ApplyNotes, LongLinesOfTheSoundAreWrappedOnPaper)
+{
+    const auto wide = [](const char* name) { return track("audio", name, clip("room", 3608, 3614)); };
+    const Sound sound("WIDE WINDOW WASH WALL A", "long line",
+                      {wide("WIDE WINDOW WASH WALL B"), wide("WIDE WINDOW WASH WALL C"),
+                       wide("WIDE WINDOW WASH WALL D"), wide("WIDE WINDOW WASH WALL E")});
+
+    sound.notes(".pdf");
+
+    const std::string paper = unbroken(textOfPdf(sound.folder / "notes.pdf"));
+    EXPECT_TRUE(tells(paper, "sound: 5 split, 1 fell out, on WIDE WINDOW WASH WALL A, WIDE WINDOW WASH WALL B, "
+                             "WIDE WINDOW WASH WALL C, WIDE WINDOW WASH WALL D and 1 more"))
+        << paper;
+}
+
 TEST(ApplyNotes, TheHeadTellsOfWhichCutTheTimesOfTheSoundAre)
 {
     const std::string sentence = "The time of a clip is its start in the old project; of what is new, and where "
