@@ -6,7 +6,7 @@
 #   make test           every test; PRESET=asan runs them under the sanitizers
 #   make build          the programs into build/release/bin, the libraries into build/release/lib
 #   make bench          the benchmarks, and the whole program against its bounds
-#   make notes-pictures the pictures of change notes in docs/pictures
+#   make docs-pictures  the pictures of change notes and of the window in docs/pictures
 #   make fuzz           every fuzzer for FUZZ_SECONDS from its corpus
 #   make pictures       draws the pictures of the window anew that the tests compare with; look at each before you keep it
 #   make format         formats every C++ file; make check-format only looks
@@ -18,7 +18,7 @@ sources = $(shell find src standin app examples tests bench fuzz -name '*.cpp' -
 reel3 = examples/reel3
 picture_tests = cadrel_gui_window_tests
 
-.PHONY: run test build bench fuzz pictures notes-pictures format check-format clean
+.PHONY: run test build bench fuzz pictures docs-pictures format check-format clean
 
 run:
 	@cmake/build.sh release cadrel
@@ -46,8 +46,8 @@ bench:
 	build/release/bin/cadrel_bench_host
 	build/release/bin/cadrel_bench_program build/release/bin/cadrel build/bench
 
-notes-pictures:
-	@cmake/build.sh release cadrel make_cuts
+docs-pictures:
+	@cmake/build.sh release cadrel make_cuts cadrel_module_tests
 	@cmake/install-packages.sh pictures
 	docs/make-pictures.sh build/release/bin
 

@@ -1,7 +1,7 @@
 #!/bin/sh
 # SPDX-License-Identifier: GPL-3.0-or-later
 # install-packages.sh WHAT: installs the Debian packages that a preset ("release", "debug", "asan", "fuzz"), a run of the
-# tests ("tests"), the pictures of change notes ("pictures") or "format" needs. Does nothing where they are all there, and on
+# tests ("tests"), the pictures of the pages in docs ("pictures") or "format" needs. Does nothing where they are all there, and on
 # systems other than Debian, where CMake says what it misses.
 set -eu
 
