@@ -8,6 +8,7 @@
 #include "app/console/Interruption.h"
 #include "app/console/PlainStringConverter.h"
 #include "app/console/Terminal.h"
+#include "app/project/ProjectAccess.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 
@@ -31,7 +32,7 @@ enum ExitStatus : int { Done = 0, WorkStopped = 1, WrongUsage = 2 };
 
 void run(int argc, char** argv, Terminal& terminal)
 {
-    const std::optional<CommandLine> line = CommandLine::parse(argc, argv);
+    std::optional<CommandLine> line = CommandLine::parse(argc, argv);
     if (!line)
         return;
     switch (line->command) {
@@ -39,6 +40,7 @@ void run(int argc, char** argv, Terminal& terminal)
         app::runGenerate(line->generate, terminal);
         break;
     case CommandLine::Command::Apply:
+        line->apply.projectFile = app::projectFileIn(line->apply.projectFile);
         app::runApply(line->apply, terminal);
         break;
     case CommandLine::Command::Notes:
@@ -48,6 +50,7 @@ void run(int argc, char** argv, Terminal& terminal)
         app::runList(line->list, terminal);
         break;
     case CommandLine::Command::Show:
+        line->show.projectFile = app::projectFileIn(line->show.projectFile);
         app::runShow(line->show, terminal);
         break;
     }

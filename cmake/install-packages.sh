@@ -12,7 +12,7 @@ case $1 in
 release) needed="$needed libbenchmark-dev" ;;
 asan | fuzz) needed="$needed clang libclang-rt-14-dev" ;;
 tests)
-    needed="chromium poppler-utils fonts-dejavu-core fonts-droid-fallback"
+    needed="chromium poppler-utils fonts-dejavu-core fonts-droid-fallback ardour"
     helpful=""
     ;;
 pictures)

@@ -347,6 +347,22 @@ std::string NotesWording::materialOf(const PictureChange& change) const
                          onScreen(source->toString(), m_document.notes.framerate())});
 }
 
+/// Names both versions where the shot has a new one.
+ChangeWords NotesWording::retimeWords(const PictureChange& change) const
+{
+    const std::string oldVersion = versionName(change.oldShot);
+    const std::string newVersion = versionName(change.newShot);
+    const auto printable = [](const std::string& name) { return toPrintable(name, MostCharactersOfAName).text; };
+    const bool isNewVersion = oldVersion != newVersion;
+    const std::string transition = withTransition(change.hasNewTransition, change.newShot);
+    const std::string former = withTransition(change.hasOldTransition, change.oldShot);
+    return {
+        speedText(*change.oldShot, *change.newShot), isNewVersion ? printable(newVersion) : nameOf(change.newShot),
+        listed({"was " + (isNewVersion ? printable(oldVersion) + ", " : "") + timecode(change.inOld->length) + " long",
+                "is " + timecode(change.inNew->length), materialOf(change), transition,
+                former == transition ? "" : withTransition(change.hasOldTransition, change.oldShot, "had a ")})};
+}
+
 ChangeWords NotesWording::describe(const PictureChange& change) const
 {
     const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
@@ -383,15 +399,8 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     case ChangeKind::Doubled:
         return {"once more " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)),
                 listed({"stood once in the old cut" + oldPlace(), formerVersion(change)})};
-    case ChangeKind::Retimed: {
-        const std::string transition = withTransition(change.hasNewTransition, change.newShot);
-        const std::string former = withTransition(change.hasOldTransition, change.oldShot);
-        return {
-            speedText(*change.oldShot, *change.newShot), name,
-            listed({"was " + timecode(change.inOld->length) + " long", "is " + timecode(change.inNew->length),
-                    materialOf(change), transition,
-                    former == transition ? "" : withTransition(change.hasOldTransition, change.oldShot, "had a ")})};
-    }
+    case ChangeKind::Retimed:
+        return retimeWords(change);
     case ChangeKind::VersionChanged:
         return {"was " + toPrintable(versionName(change.oldShot), 28).text,
                 toPrintable(versionName(change.newShot), MostCharactersOfAName).text,

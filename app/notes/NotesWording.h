@@ -95,6 +95,7 @@ public:
 private:
     std::string versionName(const core::EventBase* shot) const;
     std::string materialOf(const core::PictureChange& change) const;
+    ChangeWords retimeWords(const core::PictureChange& change) const;
     static std::string transitionText(const core::PictureChange& change);
     std::string speedText(const core::EventBase& was, const core::EventBase& now) const;
     std::string ownSpeedText(const core::EventBase* shot) const;

@@ -16,9 +16,6 @@ namespace cadrel::app {
 
 using standin::ProjectFileError;
 
-namespace {
-
-/// The fault alone: the error begins with the name of the file, in as many bytes, as a failure does.
 std::string faultIn(const ProjectFileError& error, const std::string& file)
 {
     const std::string text = error.what();
@@ -26,14 +23,21 @@ std::string faultIn(const ProjectFileError& error, const std::string& file)
     return hasName ? text.substr(file.size() + 2) : text;
 }
 
-} // namespace
-
 void requireReadableProject(const std::string& file)
 {
     toWide(file);
     std::error_code ignored;
     if (!std::filesystem::is_regular_file(file, ignored) || access(file.c_str(), R_OK) != 0)
         throw unreadable(file, FileKind::Project);
+}
+
+std::string projectFileIn(const std::string& path)
+{
+    try {
+        return standin::ProjectFile::fileIn(path).string();
+    } catch (const ProjectFileError& error) {
+        throw Failure{path, faultIn(error, path), "name the project's file"};
+    }
 }
 
 Failure readingFailure(const ProjectFileError& error, const std::string& file)

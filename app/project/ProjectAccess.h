@@ -19,6 +19,12 @@ namespace cadrel::app {
 /// Throws Failure when the name can't be that of a project that may be read.
 void requireReadableProject(const std::string& file);
 
+/// The file that is meant by a path on the command line: a folder stands for the only session in it. Throws Failure.
+std::string projectFileIn(const std::string& path);
+
+/// The fault alone: the error begins with the name of the file, in as many bytes, as a failure does.
+std::string faultIn(const standin::ProjectFileError& error, const std::string& file);
+
 /// What an error in reading or writing a project file means for the user.
 Failure readingFailure(const standin::ProjectFileError& error, const std::string& file);
 Failure writingFailure(const standin::ProjectFileError& error, const std::string& file);

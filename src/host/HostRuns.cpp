@@ -6,6 +6,7 @@
 #include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
 #include "core/protect/RestrictedRange.h"
+#include "core/protect/RunRecord.h"
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
@@ -185,10 +186,12 @@ Result::Type Host::runCadrel()
         return Result::NoProject;
     Project& project = *held;
     const core::EventList& changeList = project.model().changeEdl();
-    std::optional<core::RestrictedRange> restricted;
-    if (m_runBounds)
-        restricted.emplace(project.model().settings(), *m_runBounds);
     return withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
+        // What the user lets change; the bounds leave out what stays as it is.
+        const core::FrameRange allowed = core::RunRecord::allowedBy(project.model().settings());
+        std::optional<core::RestrictedRange> restricted;
+        if (m_runBounds)
+            restricted.emplace(project.model().settings(), *m_runBounds);
         Counted<IActionManager> actions; // once the user has cancelled
         VideoWriting video = VideoWriting::Done;
         const Result::Type result = edit(project, Apply, [&](IEditTransaction& transaction) {
@@ -211,6 +214,8 @@ Result::Type Host::runCadrel()
             double end = 0.0;
             project.getApplyRange(start, end);
             project.closeRange(isOnlySelected(project.model().settings()), start, end);
+            requireActive(project);
+            core::RunRecord::addRun(project.model(), allowed);
         });
         requireSuccess(result);
         if (actions) {

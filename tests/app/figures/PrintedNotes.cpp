@@ -407,23 +407,24 @@ PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
     if (kind == "doubled")
         return {"once more " + time, withMore(name, moreShots),
                 "stood once in the old cut" + at() + formerVersion(change)};
+    const char* const matched = m_notes.at("match") == "clip" ? "clip" : "roll";
     if (kind == "retimed") {
+        const bool isSameVersion = was.at(matched) == now.at(matched);
         const std::string speeds = isFreeze(was) || isFreeze(now)
                                        ? speedOf(was) + " now " + speedOf(now)
                                        : "speed " + percent(was) + " now " + percent(now) + " %";
         const std::string former = oldTransition == newTransition
                                        ? std::string()
                                        : withTransition(change, "oldTransition", "oldShot", "had a ");
-        return {speeds, name,
-                "was " + length(change.at("old"), "frames") + " long, is " + length(change.at("new"), "frames") + ", " +
+        return {speeds, isSameVersion ? name : cutTo(now.at(matched), ColumnsOfAName),
+                "was " + (isSameVersion ? "" : cutTo(was.at(matched), ColumnsOfAName) + ", ") +
+                    length(change.at("old"), "frames") + " long, is " + length(change.at("new"), "frames") + ", " +
                     materialOf(change) + newTransition + former};
     }
     if (kind == "reel-moved")
         return {time + (frames < 0 ? " earlier" : " later"), "the whole reel", {}};
-    if (kind == "version-changed") {
-        const char* const key = m_notes.at("match") == "clip" ? "clip" : "roll";
-        return {"was " + cutTo(was.at(key), 28), cutTo(now.at(key), ColumnsOfAName), {}};
-    }
+    if (kind == "version-changed")
+        return {"was " + cutTo(was.at(matched), 28), cutTo(now.at(matched), ColumnsOfAName), {}};
     if (kind == "transition-added")
         return {wipeOrDissolve(now) + " frames added", name, {}};
     if (kind == "transition-removed")

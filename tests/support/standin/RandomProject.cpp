@@ -3,7 +3,7 @@
 #include "tests/support/standin/RandomProject.h"
 
 #include "standin/base/AttributeList.h"
-#include "standin/file/ProjectKeys.h"
+#include "standin/stage/ProjectKeys.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Envelope.h"
 #include "standin/project/Marker.h"
