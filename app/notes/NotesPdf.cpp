@@ -35,7 +35,6 @@ constexpr double LineHeight = 10.5;
 constexpr std::size_t MostBands = 4000;
 /// A step with more lines goes on over the page.
 constexpr std::size_t MostLinesOfAPiece = 24;
-constexpr std::size_t MostCharactersOfATitle = 70;
 /// Of what stands above the rows of a reel that goes on from the page before.
 constexpr double ContinuedHeight = 30;
 
@@ -131,7 +130,7 @@ private:
     {
         const core::NoteTotals& totals = m_document.notes.totals();
         const auto time = [this](std::int32_t frames) { return m_words.timecode(frames); };
-        const std::string titles = titleOf(false) + " to " + titleOf(true);
+        const std::string titles = concatenated({m_words.cutTitle(false), " to ", m_words.cutTitle(true)});
         m_pages.describe("Change notes: " + titles,
                          toPrintable("Old cut " + m_words.cutName(false) + ", new cut " + m_words.cutName(true)).text);
         addText("Change notes", TitleFont, Ink, 22);
@@ -151,17 +150,8 @@ private:
         }
         for (const std::string& line : m_words.settings())
             addText(line, BodyFont, Dim, 13);
-        addText(m_words.order(), BodyFont, Ink, 13);
-    }
-
-    /// What the files of a cut call it, or their names where they don't; of many titles the first and the last.
-    std::string titleOf(bool isNew) const
-    {
-        const std::vector<std::string>& titles = isNew ? m_document.cuts.newTitles : m_document.cuts.oldTitles;
-        if (titles.empty())
-            return toPrintable(m_words.cutName(isNew)).text;
-        const std::string first = toPrintable(titles.front(), MostCharactersOfATitle).text;
-        return titles.size() == 1 ? first : first + " ... " + toPrintable(titles.back(), MostCharactersOfATitle).text;
+        if (const std::string order = m_words.order(); !order.empty())
+            addText(order, BodyFont, Ink, 13);
     }
 
     double xOf(std::int32_t frame) const
@@ -251,7 +241,10 @@ private:
         const auto mark = [this](const core::Programme& cut, std::size_t place, std::size_t reel, double top) {
             const double x = xOf(cut.reels()[place].start);
             m_pages.box(x, top, 0.7, StripHeight, Ink);
-            m_pages.text(x + 2, top + 9.5, std::to_string(reel + 1), ReelFont, White);
+            const std::string number = std::to_string(reel + 1);
+            // A short reel has no room for it.
+            if (x + 2 + m_pages.widthOf(number, ReelFont) <= xOf(cut.reels()[place].end()))
+                m_pages.text(x + 2, top + 9.5, number, ReelFont, White);
         };
         for (std::size_t reel = 0; reel < reels.size(); ++reel) {
             if (reels[reel].pair.oldReel)
@@ -480,29 +473,35 @@ private:
             const ChangeWords words = m_words.describe(change);
             const std::string text =
                 concatenated({words.shot, ": ", words.what, words.more.empty() ? "" : ", ", words.more});
-            for (const std::string& line : m_pages.wrapped(text, SmallFont, m_right - Margin - 92))
-                lines.emplace_back(line, Ink);
+            addWrapped(text, Ink, lines);
         }
         if (entry.step()->joined > 1)
             lines.emplace_back(
-                concatenated({"joined from ", std::to_string(entry.step()->joined), " trims that cancel out"}), Dim);
-        if (m_document.layout.showsFeet)
-            lines.emplace_back(m_words.inFeet(entry), Dim);
+                concatenated({"joined from ", std::to_string(entry.step()->joined), " steps whose trims cancel out"}),
+                Dim);
+        if (const std::string feet = m_words.inFeet(entry); m_document.layout.showsFeet && !feet.empty())
+            addWrapped(feet, Dim, lines);
         if (const core::StepSound* const sound = m_words.soundOf(entry))
             addSound(*sound, lines);
         return lines;
     }
 
-    void addSound(const core::StepSound& sound, Lines& lines) const
+    void addWrapped(const std::string& text, const PdfColour& colour, Lines& lines)
+    {
+        for (const std::string& line : m_pages.wrapped(text, SmallFont, m_right - Margin - 92))
+            lines.emplace_back(line, colour);
+    }
+
+    void addSound(const core::StepSound& sound, Lines& lines)
     {
         if (!sound.scenes.empty())
-            lines.emplace_back("scene: " + SoundWording::scenes(sound), Dim);
+            addWrapped("scene: " + SoundWording::scenes(sound), Dim, lines);
         if (sound.isEmpty())
             return;
         const SoundWording words(*m_document.sound);
-        lines.emplace_back("sound: " + words.summary(sound), Ink);
+        addWrapped("sound: " + words.summary(sound), Ink, lines);
         for (const SoundLine& line : words.lines(sound))
-            lines.emplace_back(concatenated({"    ", line.time, "  ", line.name, ": ", line.what}), Dim);
+            addWrapped(concatenated({"    ", line.time, "  ", line.name, ": ", line.whatAndMore()}), Dim, lines);
         if (const std::string rest = SoundWording::rest(sound); !rest.empty())
             lines.emplace_back("    " + rest, Dim);
     }
@@ -522,8 +521,7 @@ private:
     {
         if (entry.number > 0)
             m_pages.textToRight(Margin + 20, y, std::to_string(entry.number), BodyFont, colour);
-        m_pages.text(Margin + 28, y, m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel))), font,
-                     colour);
+        m_pages.text(Margin + 28, y, m_words.timeOf(entry, reel), font, colour);
         m_pages.text(Margin + 92, y, m_words.action(entry), font, colour);
         if (entry.lengthChange != 0)
             m_pages.textToRight(m_lengthRight, y, m_words.change(entry.lengthChange), font, colour);
