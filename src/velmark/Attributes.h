@@ -142,6 +142,9 @@ struct AttributeKey {
     /// On a copy of a memo in the preview stretch: a number made of what it was like when it was written or its memo followed
     /// it last.
     static constexpr const char* Followed = "Cadrel:Followed";
+    /// On an automation point that the system has written, to go once the curve runs the same without it: its value as a
+    /// number, so that one that somebody has given another value stays.
+    static constexpr const char* HeldValue = "Cadrel:HeldValue";
     /// On a marker: the reel of the change event, a text.
     static constexpr const char* Reel = "User:STR_MAReel";
 };

@@ -21,6 +21,8 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <functional>
+#include <limits>
 #include <string>
 #include <utility>
 #include <vector>
@@ -94,6 +96,20 @@ public:
     int32 addHandler(IActionHandler*) override { return ResultFalse; }
     int32 removeHandler(IActionHandler*) override { return ResultFalse; }
     int32 invoke(const char*, const char*, int32) override { return ResultFalse; }
+};
+
+/// Alerts whose user does something before he goes on.
+class WatchedAlerts : public Implements<WatchedAlerts, FObject, IAlertService> {
+public:
+    static constexpr const char* ClassName = "WatchedAlerts";
+
+    std::function<void()> whenShown;
+
+    int32 show(const char16_t*, const char16_t*, const char16_t*, const char16_t*) override
+    {
+        whenShown();
+        return 1;
+    }
 };
 
 /// A film of two clips of ten seconds that change places.
@@ -427,6 +443,115 @@ TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
     for (const AdaptedHost::Node& point :
          standin::tests::childrenOf(*host.curveOf(track, standin::Envelope::Curve::Volume)))
         EXPECT_LT(point->getStart(nullptr), host.inHost(20.0));
+}
+
+TEST(HostRunRange, LosesNothingWhereItsBoundsReachPastTheDayThatTimecodesName)
+{
+    for (const double after : {86400.0, 86400.04, 86486.36, std::numeric_limits<double>::infinity()}) {
+        SCOPED_TRACE(after);
+        AdaptedHost host(0.0);
+        const auto track = host.addTrack(TypeWord::Audio, u"DX");
+        host.addClip(track, u"one", 0.0, 10.0);
+        host.addClip(track, u"two", 10.0, 20.0);
+        host.switchMarkersOff();
+        host.carryOver("00:00:00:00", "00:00:10:00", "00:00:10:00", "00:00:20:00");
+        host.carryOver("00:00:10:00", "00:00:20:00", "00:00:00:00", "00:00:10:00");
+        host.settings().setRestrictRange(true);
+        host.settings().setPreserveMaterial(0.0, after);
+
+        host.conform();
+
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+        // This film stands an hour before the others.
+        EXPECT_EQ(host.contentOf(track), (Texts{"two -3600--3590", "one -3590--3580"}));
+    }
+}
+
+TEST(HostRunRange, LeavesNothingBehindThatWouldStandPastTheDayThatTimecodesName)
+{
+    AdaptedHost host(86340.0);
+    const auto track = host.addTrack(TypeWord::Audio, u"DX");
+    host.addClip(track, u"one", 0.0, 30.0);
+    host.switchMarkersOff();
+    // Ten seconds of the source come after the end of the day.
+    host.carryOver("23:59:00:00", "23:59:20:00", "23:59:50:00", "23:59:59:24");
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    // The clock begins 82740 s after the other films.
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 82790-82800"}));
+    EXPECT_NE(track->hasAttribute(AttributeKey::Preview), ResultOk);
+    EXPECT_NE(track->hasAttribute(AttributeKey::PreviewEvents), ResultOk);
+}
+
+TEST_P(HostRunTest, AddsNoPointsToTheCurvesOfAFilmThatIsPutBackAsItWas)
+{
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    for (const auto& [time, value] :
+         {std::pair(2.0, 0.5F), std::pair(5.0, 0.8F), std::pair(18.0, 0.8F), std::pair(19.0, 0.0F)})
+        host.addPoint(track, volume, host.inHost(time), value);
+    const auto points = [&] {
+        std::vector<std::pair<double, float>> found;
+        for (const AdaptedHost::Node& point : standin::tests::childrenOf(*host.curveOf(track, volume)))
+            found.emplace_back(point->getStart(nullptr), query<IAutomationPoint>(point)->getValue());
+        return found;
+    };
+    const auto before = points();
+
+    for (int round = 0; round < 3; ++round) {
+        host.conform();
+        // The jump between the two clips takes two points.
+        EXPECT_EQ(points().size(), 6U);
+        host.conform();
+        EXPECT_EQ(points(), before);
+    }
+}
+
+TEST_P(HostRunTest, StoresTheUsersBoundsWhenItIsSavedWhileARunWithinOthersGoesOn)
+{
+    host.settings().setPreserveMaterial(3.0, 4.0);
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") != std::string::npos)
+            host.project.announceStoring();
+    };
+    ASSERT_EQ(host.adapter().startCadrelWithin({host.onClock(0.0), host.onClock(20.0)}), Result::Ok);
+
+    host.idle();
+    host.adapter().removeListener(&heard);
+    host.disconnect();
+    host.connect();
+
+    EXPECT_FALSE(host.settings().restrictRange());
+    EXPECT_EQ(host.settings().preserveMaterialBefore(), 3.0);
+    EXPECT_EQ(host.settings().preserveMaterialAfter(), 4.0);
+}
+
+TEST_P(HostRunTest, MakesTheMemosAnewThatTheUserRemovesWhileItsAlertIsUp)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:00:00"), core::Timecode("00:00:20:00")),
+        false);
+    host.project.setTimeOrigin(3606.0);
+    host.idle();
+    const auto alerts = makeCounted<WatchedAlerts>();
+    int shown = 0;
+    alerts->whenShown = [&] {
+        if (++shown > 1)
+            return;
+        const AdaptedHost::Node memos = host.trackNamed(u"Memos");
+        host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(memos->getParent(), memos.get())); });
+    };
+    host.altered.replace(IAlertService::iid, alerts);
+    host.conform();
+    ASSERT_EQ(shown, 1);
+    ASSERT_FALSE(host.trackNamed(u"Memos"));
+
+    host.conform();
+
+    EXPECT_EQ(heard.results, (Results{Result::Ok, Result::Ok}));
+    EXPECT_TRUE(host.trackNamed(u"Memos"));
 }
 
 TEST_P(HostRunTest, LeavesOutWhatHasNoTimecodes)
@@ -780,7 +905,7 @@ TEST_P(HostRunTest, DoesNothingMoreOnceItIsCancelled)
 
     ASSERT_TRUE(host.redo());
 
-    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel (incomplete)");
     EXPECT_FALSE(host.trackNamed(u"New Video")) << "The first event was carried over, and that was all.";
 }
 
@@ -995,8 +1120,7 @@ TEST_P(HostRunTest, TellsThatItIsIncompleteWhereTheHostRefusesToTakeItBack)
 
     host.idle();
 
-    // The name was given before.
-    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
     EXPECT_EQ(heard.results, Results{Result::HostCallFailed});
     EXPECT_FALSE(host.isEditOpen());
     EXPECT_FALSE(host.application.idleManager().isBlocked());
