@@ -14,6 +14,7 @@
 #include "tests/support/ThrownResult.h"
 #include "tests/support/host/WatchedProgress.h"
 #include "velmark/Attributes.h"
+#include "velmark/Automation.h"
 #include "velmark/ClassId.h"
 
 #include <gtest/gtest.h>
@@ -555,6 +556,45 @@ TEST_P(HostPreviewStretchTest, LeavesTheAutomationOfTheFilmWhereATrackKeepsAReco
     for (const Node& point : standin::tests::childrenOf(*host.curveOf(other, volume)))
         points.push_back(point->getStart(nullptr));
     EXPECT_EQ(points, (std::vector<double>{host.inHost(3.0), host.inHost(15.0)}));
+}
+
+TEST_P(HostPreviewStretchTest, BendsNoCurveWhereAnotherTrackKeepsAnEarlierRecordOfAnotherPreview)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    const Node other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addPoint(other, volume, host.inHost(3.0), 0.25F);
+    host.addPoint(other, volume, host.inHost(15.0), 0.75F);
+    host.addPoint(other, volume, host.inHost(6000.0), 0.5F);
+    const auto points = [&] {
+        Texts found;
+        for (const Node& point : standin::tests::childrenOf(*host.curveOf(other, volume))) {
+            const double time = point->getStart(nullptr) - host.inHost(0.0);
+            if (time < Day - 1.0)
+                found.push_back(std::to_string(time) + " " +
+                                std::to_string(query<IAutomationPoint>(point)->getValue()));
+        }
+        return found;
+    };
+    const Texts before = points();
+    ASSERT_EQ(before.size(), 3U);
+    for (const double recordStart : {12.0, 5000.0}) {
+        SCOPED_TRACE(recordStart);
+        previewAll();
+        // After the copies the user lets the curve go on at another value.
+        const Node last = standin::tests::childrenOf(*host.curveOf(other, volume)).back();
+        host.edit(u"Automation", [&] { requireOk(query<IAutomationPoint>(last)->setValue(0.125F)); });
+        host.addPoint(other, volume, Day + host.inHost(100.0), 0.125F);
+        const Node imported = host.addTrack(TypeWord::Audio, u"Imported");
+        const double start = host.inHost(recordStart);
+        host.edit(u"Import", [&] {
+            writeNumbers(host.context(), *imported, AttributeKey::Preview, {start, start + 1.0});
+        });
+
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(points(), before);
+        EXPECT_EQ(host.contentOf(track), film);
+    }
 }
 
 // Memos.

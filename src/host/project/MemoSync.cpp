@@ -4,6 +4,7 @@
 
 #include "core/edl/EventBase.h"
 #include "host/border/HostFailure.h"
+#include "host/project/HostFramerate.h"
 #include "host/project/MemoMark.h"
 #include "host/project/MemoPlaces.h"
 #include "host/project/PlacedMemos.h"
@@ -41,11 +42,28 @@ std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
     return ids;
 }
 
+/// Of those before a time, in seconds of the project's clock.
+std::set<std::int64_t> idsBefore(const PlacedMemos& memos, double end)
+{
+    std::set<std::int64_t> ids;
+    for (const PlacedMemo& memo : memos.all()) {
+        if (isBefore(memo.span.start, end))
+            ids.insert(memo.id);
+    }
+    return ids;
+}
+
 /// Which sides of a copy the user has edited.
 struct Edited {
     bool name;
     bool place;
 };
+
+template <class Memo>
+Edited differencesOf(const Memo& one, const Memo& other)
+{
+    return {one.name != other.name, one.start != other.start || one.end != other.end};
+}
 
 /// Since it was marked. What isn't marked may have been edited in each way.
 Edited editedSinceMark(const HostEvent& copy)
@@ -90,6 +108,21 @@ double MemoSync::Stretch::clamped(double sourceTime) const
 double MemoSync::Stretch::toSource(double previewTime) const
 {
     return clamped(previewTime - preview.start + source.start);
+}
+
+//     copy     preview  |=== material ===|--- nothing ---|
+//                                            |-- loud --|
+//     memo     source   |================|
+//                             |-- loud --|
+SecondsRange MemoSync::Stretch::toSource(const SecondsRange& copy) const
+{
+    const SecondsRange memo{toSource(copy.start), toSource(copy.end)};
+    return isBefore(memo.start, memo.end) ? memo : SecondsRange{clamped(memo.end - (copy.end - copy.start)), memo.end};
+}
+
+bool MemoSync::Stretch::isSlower() const
+{
+    return isBefore(source.end - source.start, preview.end - preview.start);
 }
 
 //     event i           preview  |=================|
@@ -234,7 +267,7 @@ public:
 private:
     void followStretch(const PlacedMemos& placed, const Shown& shown, const Remembered* remembered)
     {
-        MemosById sources(sourcesOf(placed, shown, remembered != nullptr), shown.stretch.source);
+        MemosById sources(sourcesOf(placed, shown, remembered), shown.stretch.source);
         if (remembered)
             followEdits(shown, sources, *remembered);
         else
@@ -257,7 +290,9 @@ private:
         });
         gone.settle();
         std::erase_if(edited, [&](const PlacedMemo& copy) {
-            const std::optional<Memo> before = gone.take(memoOf(copy.event));
+            // One that was there already isn't another that has gone since.
+            const Memo now = memoOf(copy.event);
+            const auto before = m_sync.m_notFollowed.contains(now) ? std::nullopt : gone.take(now);
             return (before || hasOneMemo(copy)) && carryOver(copy, sources, stretch, before);
         });
         // What the user has written in the real programme meanwhile has no copy that he could have removed, and the memos of
@@ -268,8 +303,10 @@ private:
             if (const auto memo = sources.take(removed.id, stretch.toSource(removed.start)))
                 remove(*memo);
         }
-        for (const PlacedMemo& copy : edited)
-            writeMemoOf(copy, stretch);
+        for (const PlacedMemo& copy : edited) {
+            if (!isLeftOfRemoved(copy))
+                writeMemoOf(copy, stretch);
+        }
     }
 
     /// As long as nothing is known of what the user has done, the numbers tell whether he has removed or written something.
@@ -301,16 +338,33 @@ private:
                MemoMark::keptBy(*copy.event.node()); // what was pasted from the real programme has none
     }
 
-    /// The memos that a stretch shows.
-    static std::vector<PlacedMemo> sourcesOf(const PlacedMemos& memos, const Shown& shown, bool isKnown)
+    /// Whether the user has now removed the memo of a copy that he had edited before, while nobody followed.
+    bool isLeftOfRemoved(const PlacedMemo& copy) const
+    {
+        return !m_counts.contains(copy.id) && MemoMark::keptBy(*copy.event.node()) &&
+               m_sync.m_notFollowed.contains(memoOf(copy.event));
+    }
+
+    /// The memos that a stretch shows. What was there is null where that isn't known.
+    static std::vector<PlacedMemo> sourcesOf(const PlacedMemos& memos, const Shown& shown, const Remembered* remembered)
     {
         const Stretch& stretch = shown.stretch;
         std::vector<PlacedMemo> found;
         std::vector<PlacedMemo> reaching;
-        memos.visitTouching(stretch.source, [&](const PlacedMemo& memo) {
+        const auto wasHere = [remembered](const PlacedMemo& memo) {
+            if (!remembered)
+                return false;
+            const auto copy = remembered->copies.lower_bound(firstOf(memo.id));
+            return copy != remembered->copies.end() && copy->id == memo.id;
+        };
+        // The memo of a copy that stands where nothing is left of the source stands at its end.
+        const double end = stretch.source.end + (stretch.isSlower() ? 2.0 * core::SameInstant : 0.0);
+        memos.visitTouching({stretch.source.start, end}, [&](const PlacedMemo& memo) {
             if (liesIn(memo.span, stretch.source))
                 found.push_back(memo);
-            else if (reachesInto(memo.span, stretch.source))
+            else if (!isBefore(memo.span.start, stretch.source.end) && wasHere(memo))
+                found.push_back(memo);
+            else
                 reaching.push_back(memo);
         });
         if (reaching.empty())
@@ -319,7 +373,7 @@ private:
         const std::set<std::int64_t> copied = idsOf(shown.copies);
         std::set<std::int64_t> taken = idsOf(found);
         for (PlacedMemo& memo : reaching) {
-            if (copied.contains(memo.id) && (isKnown || taken.insert(memo.id).second))
+            if (copied.contains(memo.id) && (remembered || taken.insert(memo.id).second))
                 found.push_back(std::move(memo));
         }
         return found;
@@ -349,13 +403,13 @@ private:
             return;
 
         // What hangs over an edge of the stretch isn't in the preview, and stays.
-        const auto followed = [&stretch](double own, double inPreview) {
-            const double mapped = stretch.toSource(inPreview);
+        const auto followed = [&stretch](double own, double mapped) {
             return std::abs(stretch.clamped(own) - mapped) < core::SameInstant ? own : mapped;
         };
         const auto [ownStart, ownEnd] = placed.span;
-        const double start = followed(ownStart, edited.start);
-        const double end = followed(ownEnd, edited.end);
+        const SecondsRange mapped = stretch.toSource(SecondsRange{edited.start, edited.end});
+        const double start = followed(ownStart, mapped.start);
+        const double end = followed(ownEnd, mapped.end);
         if (start == ownStart && (!memo.isRange() || end == ownEnd))
             return;
         noteChange(placed.span);
@@ -365,16 +419,13 @@ private:
         noteChange({start, std::max(start, memo.getEnd())});
     }
 
-    static Edited differencesOf(const Memo& one, const Memo& other)
-    {
-        return {one.name != other.name, one.start != other.start || one.end != other.end};
-    }
     /// What was done to the memo itself is the later edit.
     Edited editedWhereUnknown(const HostEvent& copy, const Memo& memo) const
     {
         Edited edited = editedSinceMark(copy);
-        if (const auto before = m_sync.m_behind.find(memo.id); before != m_sync.m_behind.end()) {
-            const Edited later = differencesOf(memo, before->second);
+        if (const auto last = m_sync.m_behind.find(memo.id); last != m_sync.m_behind.end()) {
+            const Behind now = laterThan(last->second, {memo, memo, {memoOf(copy)}});
+            const Edited later = differencesOf(memo, now.before);
             edited = {edited.name && !later.name, edited.place && !later.place};
         }
         return edited;
@@ -384,7 +435,7 @@ private:
     {
         HostEvent copy = written.event;
         copy.setUserId(m_newIds.next());
-        const SecondsRange span{stretch.toSource(copy.getStart()), stretch.toSource(copy.getEnd())};
+        const SecondsRange span = stretch.toSource(written.span);
         noteChange(span);
         Marker{span.start, span.end, copy.getName(), {}, copy.getUserId()}.insertInto(m_sync.m_hostContext,
                                                                                       m_transaction, m_memos);
@@ -421,14 +472,17 @@ private:
 
 void MemoSync::forget()
 {
-    m_remembered.clear();
-    m_knownIds.clear();
+    forgetCopies({});
     m_behind.clear();
+    m_wereBehind.clear();
 }
 
 void MemoSync::forgetCopies(const Events& events)
 {
-    forget();
+    m_noted.reset();
+    m_remembered.clear();
+    m_knownIds.clear();
+    m_notFollowed.clear();
     for (const auto& event : events)
         m_remembered.try_emplace(event);
 }
@@ -436,32 +490,75 @@ void MemoSync::forgetCopies(const Events& events)
 void MemoSync::remember(const Track& memos, const Previewed& previewed)
 {
     // What is known in part would look as if the user had written the rest.
+    const auto lastBehind = std::exchange(m_behind, {});
     forgetCopies(previewed.events);
-    const PlacedMemos placed(memos);
+    if (memos.isAlive())
+        note(PlacedMemos(memos), memos, previewed, lastBehind);
+    m_noted = Noted{Velmark::Counted<Velmark::ITrackNode>::share(memos.node()), previewed.events, previewed.framerate,
+                    timesOf(previewed)};
+}
+
+void MemoSync::note(const PlacedMemos& placed, const Track& memos, const Previewed& previewed,
+                    const std::map<std::int64_t, Behind>& lastBehind)
+{
     if (placed.all().empty())
         return;
     auto found = m_remembered;
     std::set<std::int64_t> ids;
-    std::set<std::int64_t> editedIds;
+    std::set<Memo> notFollowed;
+    std::map<std::int64_t, std::set<Memo>> ahead;
     const Preview preview = previewOf(placed, previewed);
     const auto edited = editedSince(memos, preview.shown);
+    const double previewStart = previewed.offset + previewed.moved;
+    const std::set<std::int64_t> ownIds = edited.empty() ? std::set<std::int64_t>() : idsBefore(placed, previewStart);
     for (const Shown& shown : preview.shown) {
         for (const PlacedMemo& copy : shown.copies) {
-            if (edited.contains(copy.event.node())) {
-                editedIds.insert(copy.id);
+            const Memo memo = memoOf(copy.event);
+            const bool isEdited = edited.contains(copy.event.node());
+            const bool hadMemo = !isEdited || MemoMark::keptBy(*copy.event.node());
+            if (isEdited && (!hadMemo || ownIds.contains(copy.id))) {
+                notFollowed.insert(memo);
+                if (hadMemo)
+                    ahead[copy.id].insert(memo);
                 continue;
             }
-            found[shown.event][shown.piece].copies.insert(memoOf(copy.event));
+            found[shown.event][shown.piece].copies.insert(memo);
             ids.insert(copy.id);
         }
     }
-    m_behind = onlyOnes(placed, previewed.offset + previewed.moved, editedIds);
+    for (const auto& [id, memo] : onlyOnes(placed, previewStart, ahead)) {
+        Behind behind{memo, memo, ahead.at(id)};
+        if (const auto last = lastBehind.find(id); last != lastBehind.end())
+            behind = laterThan(last->second, std::move(behind));
+        // An undo or redo brings back what was.
+        behind.before = m_wereBehind.try_emplace({memo, behind.copies}, behind.before).first->second;
+        m_behind.emplace(id, std::move(behind));
+    }
+    m_notFollowed = std::move(notFollowed);
     m_remembered = std::move(found);
     m_knownIds = std::move(ids);
 }
 
+MemoSync::Behind MemoSync::laterThan(const Behind& last, Behind now)
+{
+    const auto isNew = [&last](const Memo& copy, bool Edited::*side) {
+        return std::ranges::all_of(last.copies, [&](const Memo& other) { return differencesOf(copy, other).*side; });
+    };
+    const auto isEdited = [&](bool Edited::*side) {
+        return !(differencesOf(now.memo, last.memo).*side) &&
+               std::ranges::any_of(now.copies, [&](const Memo& copy) { return isNew(copy, side); });
+    };
+    if (!isEdited(&Edited::name))
+        now.before.name = last.before.name;
+    if (!isEdited(&Edited::place)) {
+        now.before.start = last.before.start;
+        now.before.end = last.before.end;
+    }
+    return now;
+}
+
 std::map<std::int64_t, MemoSync::Memo> MemoSync::onlyOnes(const PlacedMemos& memos, double end,
-                                                          const std::set<std::int64_t>& ids)
+                                                          const std::map<std::int64_t, std::set<Memo>>& ids)
 {
     std::map<std::int64_t, Memo> found;
     std::set<std::int64_t> shared;
@@ -526,6 +623,17 @@ void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTrans
         return;
     const Preview preview = previewOf(placed, previewed);
     Following(*this, memos, preview, transaction).follow(std::move(placed), previewed.offset + previewed.moved);
+}
+
+bool MemoSync::hasNoted(const Track& memos, const Previewed& previewed) const
+{
+    return m_noted && m_noted->track.get() == memos.node() && m_noted->events == previewed.events &&
+           areSame(m_noted->framerate, previewed.framerate) && m_noted->times == timesOf(previewed);
+}
+
+std::array<double, 3> MemoSync::timesOf(const Previewed& previewed)
+{
+    return {previewed.offset, previewed.begin, previewed.moved};
 }
 
 const MemoSync::Remembered* MemoSync::rememberedOf(const Shown& shown) const

@@ -254,6 +254,10 @@ private:
     /// Of the last automation point.
     double latestPoint(const std::vector<Track>& tracks) const;
     void syncMemos(Velmark::IEditTransaction& transaction);
+    /// Whether what rememberMemos has noted last still holds. Only while the host tells of changes.
+    bool hasNotedMemos();
+    /// The track of the memos; dead or empty where there is none.
+    const Track& memoTrack();
 
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
@@ -262,9 +266,8 @@ private:
     bool isMarkerTrackOfRuns(const Track& track) const;
     /// All that a run may change but these.
     std::vector<Track> tracksOfTheUser();
-    /// What of a track's events in a stretch the system hasn't written, in seconds from the time origin.
-    static std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
-                                                                            const core::SecondsRange& stretch);
+    /// Takes away what the tracks have written down.
+    void clearWritten(Velmark::IEditTransaction& transaction, const std::vector<Track>& tracks);
     /// Removes the copies that their memos have followed, wherever they stand: what the user has made of them is in their
     /// memos, which stand before `start`, in seconds from the time origin. All others that he has edited are his own.
     void removeFollowed(Velmark::IEditTransaction& transaction, double start);
