@@ -350,8 +350,13 @@ TEST_P(HostPreviewStretchTest, LeavesNoPointOfItsOwnWhoseValueIsRounded)
     }
 
     host.conform();
-    for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, volume)))
-        EXPECT_LT(point->getStart(nullptr), Day - host.origin);
+    // The curve falls by 0.2 in a second.
+    const auto left = standin::tests::childrenOf(*host.curveOf(track, volume));
+    ASSERT_EQ(left.size(), 2U);
+    EXPECT_NEAR(left[0]->getStart(nullptr), host.inHost(10.0), 1e-9);
+    EXPECT_NEAR(query<IAutomationPoint>(left[0])->getValue(), 0.436, 1e-6);
+    EXPECT_NEAR(left[1]->getStart(nullptr), host.inHost(11.04), 1e-9);
+    EXPECT_NEAR(query<IAutomationPoint>(left[1])->getValue(), 0.228, 1e-6);
     adapter().setPreviewActive(true);
     EXPECT_EQ(previewOffset(), Day);
 }

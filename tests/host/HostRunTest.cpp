@@ -8,6 +8,7 @@
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
+#include "standin/project/AutomationPoint.h"
 #include "standin/project/Track.h"
 #include "standin/services/IdleManager.h"
 #include "tests/support/core/RecordingListener.h"
@@ -440,9 +441,13 @@ TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
 
     host.conform();
 
-    for (const AdaptedHost::Node& point :
-         standin::tests::childrenOf(*host.curveOf(track, standin::Envelope::Curve::Volume)))
-        EXPECT_LT(point->getStart(nullptr), host.inHost(20.0));
+    // What is carried over runs as what was there, on into what stays.
+    const auto points = standin::tests::childrenOf(*host.curveOf(track, standin::Envelope::Curve::Volume));
+    ASSERT_EQ(points.size(), 2U);
+    EXPECT_EQ(points[0]->getStart(nullptr), host.inHost(2.0));
+    EXPECT_EQ(query<IAutomationPoint>(points[0])->getValue(), 0.25F);
+    EXPECT_EQ(points[1]->getStart(nullptr), host.inHost(18.0));
+    EXPECT_EQ(query<IAutomationPoint>(points[1])->getValue(), 0.75F);
 }
 
 TEST(HostRunRange, LosesNothingWhereItsBoundsReachPastTheDayThatTimecodesName)
@@ -467,6 +472,24 @@ TEST(HostRunRange, LosesNothingWhereItsBoundsReachPastTheDayThatTimecodesName)
     }
 }
 
+TEST_P(HostRunTest, ReplacesNothingBetweenBoundsThatAreNoNumbersOrTheWrongWayRound)
+{
+    constexpr double Infinity = std::numeric_limits<double>::infinity();
+    constexpr double NoNumber = std::numeric_limits<double>::quiet_NaN();
+    host.settings().setRestrictRange(true);
+    for (const auto& [before, after] : {std::pair(0.0, NoNumber), std::pair(NoNumber, 86400.0), std::pair(86400.0, 0.0),
+                                        std::pair(Infinity, Infinity), std::pair(-Infinity, -Infinity)}) {
+        SCOPED_TRACE(std::to_string(before) + " to " + std::to_string(after));
+        host.settings().set(&core::Settings::preserveMaterialBefore, before);
+        host.settings().set(&core::Settings::preserveMaterialAfter, after);
+
+        host.conform();
+
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+        EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    }
+}
+
 TEST(HostRunRange, LeavesNothingBehindThatWouldStandPastTheDayThatTimecodesName)
 {
     AdaptedHost host(86340.0);
@@ -485,26 +508,35 @@ TEST(HostRunRange, LeavesNothingBehindThatWouldStandPastTheDayThatTimecodesName)
     EXPECT_NE(track->hasAttribute(AttributeKey::PreviewEvents), ResultOk);
 }
 
-TEST_P(HostRunTest, AddsNoPointsToTheCurvesOfAFilmThatIsPutBackAsItWas)
+TEST_P(HostRunTest, AddsNoPointsToTheCurvesThatCountAsTheUsers)
 {
     constexpr auto volume = standin::Envelope::Curve::Volume;
-    for (const auto& [time, value] :
-         {std::pair(2.0, 0.5F), std::pair(5.0, 0.8F), std::pair(18.0, 0.8F), std::pair(19.0, 0.0F)})
-        host.addPoint(track, volume, host.inHost(time), value);
-    const auto points = [&] {
-        std::vector<std::pair<double, float>> found;
-        for (const AdaptedHost::Node& point : standin::tests::childrenOf(*host.curveOf(track, volume)))
-            found.emplace_back(point->getStart(nullptr), query<IAutomationPoint>(point)->getValue());
+    using Points = std::vector<std::pair<double, float>>;
+    const auto set = [this](const Points& points) {
+        Points inHost;
+        for (const auto& [time, value] : points)
+            inHost.emplace_back(host.inHost(time), value);
+        return inHost;
+    };
+    const Points before = set({{2.0, 0.5F}, {5.0, 0.8F}, {18.0, 0.8F}, {19.0, 0.0F}});
+    for (const auto& [time, value] : before)
+        host.addPoint(track, volume, time, value);
+    // The host knows which ones it has put at the edges of what was copied.
+    const auto users = [&] {
+        Points found;
+        for (const AdaptedHost::Node& child : standin::tests::childrenOf(*host.curveOf(track, volume))) {
+            auto& point = dynamic_cast<standin::AutomationPoint&>(*child);
+            if (!point.isHolding())
+                found.emplace_back(point.start(), point.getValue());
+        }
         return found;
     };
-    const auto before = points();
 
     for (int round = 0; round < 3; ++round) {
         host.conform();
-        // The jump between the two clips takes two points.
-        EXPECT_EQ(points().size(), 6U);
+        EXPECT_EQ(users(), set({{8.0, 0.8F}, {9.0, 0.0F}, {12.0, 0.5F}, {15.0, 0.8F}}));
         host.conform();
-        EXPECT_EQ(points(), before);
+        EXPECT_EQ(users(), before);
     }
 }
 
@@ -543,9 +575,10 @@ TEST_P(HostRunTest, MakesTheMemosAnewThatTheUserRemovesWhileItsAlertIsUp)
         const AdaptedHost::Node memos = host.trackNamed(u"Memos");
         host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(memos->getParent(), memos.get())); });
     };
+    host.altered.unhide(IAlertService::iid);
     host.altered.replace(IAlertService::iid, alerts);
     host.conform();
-    ASSERT_EQ(shown, 1);
+    ASSERT_GE(shown, 1);
     ASSERT_FALSE(host.trackNamed(u"Memos"));
 
     host.conform();

@@ -386,8 +386,11 @@ void Project::getApplyRange(double& start, double& end) const
     // isn't replaced either: there the preview itself may stand.
     const double latest = std::min(requiredOffset(), dayLength());
     const core::Settings& settings = m_model.settings();
-    start = settings.restrictRange() ? std::min(settings.preserveMaterialBefore(), latest) : 0.0;
+    start = settings.restrictRange() ? std::max(settings.preserveMaterialBefore(), 0.0) : 0.0;
     end = settings.restrictRange() ? std::min(settings.preserveMaterialAfter(), latest) : latest;
+    // Nothing lies between bounds that are stored the wrong way round, or are no numbers.
+    if (!(start <= end))
+        start = end = latest;
 }
 
 void Project::closeRange(bool onlySelected, double start, double end)

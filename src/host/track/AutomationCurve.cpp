@@ -69,7 +69,11 @@ void AutomationCurve::fill(IHostContext* context, IEditTransaction& transaction,
 {
     if (end < start || isEmpty())
         return;
-    leadThrough(context, transaction, {{start, valueBefore(start)}, {end, valueBehind(end)}});
+    // Whoever wants it filled wants these points: none of them goes again by itself.
+    replace(context, transaction, firstAt(start), firstAfter(end),
+            {{start, valueBefore(start)}, {end, valueBehind(end)}});
+    for (const Point* const point : {&m_left[m_left.size() - 2], &m_left.back()})
+        requireOk(point->node->removeAttribute(AttributeKey::HeldValue));
 }
 
 void AutomationCurve::hold(IHostContext* context, IEditTransaction& transaction, double start, double end)
@@ -171,15 +175,31 @@ void AutomationCurve::leadThrough(IHostContext* context, IEditTransaction& trans
     const double end = places.back().time;
     std::size_t first = firstAt(start);
     std::size_t last = firstAfter(end);
+    // What comes to stand at the same time stands exactly there, so that only its order counts.
+    const auto moveTo = [&places](double from, double to) {
+        for (Place& place : places) {
+            if (place.time == from)
+                place.time = to;
+        }
+    };
     if (first < last && !isBefore(start, at(first).time)) {
-        ++first;
+        moveTo(start, at(first).time);
         places.erase(places.begin());
+        ++first;
     }
-    if (first < last && !isBefore(at(last - 1).time, end)) {
+    const bool keepsLast = first < last && !isBefore(at(last - 1).time, end);
+    if (keepsLast) {
         --last;
+        moveTo(end, at(last).time);
         places.pop_back();
     }
     replace(context, transaction, first, last, places);
+    // The host puts a point after those that stand there already.
+    if (keepsLast && !places.empty() && !isBefore(places.back().time, end)) {
+        IProjectNode* const kept = m_right.back().node.get();
+        requireOk(transaction.remove(m_curve.get(), kept));
+        requireOk(transaction.insert(m_curve.get(), kept));
+    }
 }
 
 void AutomationCurve::replace(IHostContext* context, IEditTransaction& transaction, std::size_t first, std::size_t last,

@@ -32,8 +32,8 @@ public:
     core::AutomationState stateAt(double time) const;
 
     /// Lets the curve run straight from its value at `start` to its value at `end`. All points from `start` to `end` are
-    /// replaced by one point at each of them, which is a new one where none has stood. Does nothing to a curve without
-    /// points, and for an end before the start.
+    /// replaced by one new point at each of them. Does nothing to a curve without points, and for an end before the
+    /// start.
     ///
     ///     before   --\  .--.  /--          after   --.        /--
     ///                 \_|  |_/                        `-.____/
@@ -58,7 +58,7 @@ public:
     /// As hold, but for good where no point stands after `end`.
     void holdLast(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end);
 
-    /// Takes away what an object of this class has written from `start` to `end`, where the curve runs the same without it.
+    /// Takes away what was held by an object of this class from `start` to `end`, where the curve runs the same without it.
     void dropNeedless(Velmark::IEditTransaction& transaction, double start, double end);
 
 private:
