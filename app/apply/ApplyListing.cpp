@@ -164,6 +164,7 @@ void ApplyListing::printTotals(std::ostream& out) const
     printLost(out);
 
     printClips(out);
+    printStaying(out);
     printWritten(out);
 }
 
@@ -207,6 +208,15 @@ void ApplyListing::printClips(std::ostream& out) const
     for (const TrackComparison* const track : m_facts.markedTracks())
         marked.push_back(std::to_string(track->added.size()) + " " + printableName(track->track->name()));
     out << "New markers " << (marked.empty() ? "none" : joined(marked)) << '\n';
+}
+
+void ApplyListing::printStaying(std::ostream& out) const
+{
+    const char* title = "Stays       ";
+    for (const std::string& what : m_facts.staying) {
+        out << title << toPrintable(what).text << '\n';
+        title = "            ";
+    }
 }
 
 void ApplyListing::printWritten(std::ostream& out) const

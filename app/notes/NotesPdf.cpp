@@ -11,6 +11,8 @@
 #include <algorithm>
 #include <array>
 #include <functional>
+#include <iterator>
+#include <numeric>
 #include <optional>
 #include <string>
 #include <utility>
@@ -29,6 +31,8 @@ constexpr double FootHeight = 22;
 constexpr double StripHeight = 14;
 constexpr double BandHeight = 84;
 constexpr double LineHeight = 10.5;
+/// A printer with 600 dots to the inch has about as many across the paper. More bands can't be told from each other.
+constexpr std::size_t MostBands = 4000;
 /// A step with more lines goes on over the page.
 constexpr std::size_t MostLinesOfAPiece = 24;
 constexpr std::size_t MostCharactersOfATitle = 70;
@@ -40,7 +44,7 @@ constexpr PdfColour White{1.0, 1.0, 1.0};
 constexpr PdfColour Dim{0.42, 0.45, 0.48};
 constexpr PdfColour Rule{0.85, 0.84, 0.82};
 constexpr PdfColour Kept{0.49, 0.58, 0.68};
-constexpr PdfColour Band{0.49, 0.58, 0.68, 0.34};
+constexpr PdfColour Staying{0.49, 0.58, 0.68, 0.34};
 constexpr PdfColour Moved{0.83, 0.54, 0.12, 0.7};
 constexpr PdfColour Doubled{0.54, 0.36, 0.75, 0.7};
 constexpr PdfColour Lifted{0.78, 0.27, 0.23};
@@ -89,6 +93,17 @@ public:
 
 private:
     using Lines = std::vector<std::pair<std::string, PdfColour>>;
+    /// From where picture was to where it is.
+    struct Band {
+        FrameSpan inOld;
+        FrameSpan inNew;
+        PdfColour colour;
+    };
+    /// Of a strip of the picture.
+    struct Stretch {
+        double left;
+        double right;
+    };
 
     void add(double height, std::function<void(PdfPages&, double)> draw, bool goesWithNext = false)
     {
@@ -158,14 +173,36 @@ private:
 
     void drawBox(const FrameSpan& frames, double top, const PdfColour& colour)
     {
-        const double left = xOf(frames.start);
-        m_pages.box(left, top, std::max(0.3, xOf(frames.end()) - left), StripHeight, colour);
+        const Stretch stretch = stretchOf(frames);
+        m_pages.box(stretch.left, top, stretch.right - stretch.left, StripHeight, colour);
     }
 
-    void drawBand(const FrameSpan& inOld, const FrameSpan& inNew, double top, const PdfColour& colour)
+    /// The frames are wide enough to be seen.
+    Stretch stretchOf(const FrameSpan& frames) const
     {
-        m_pages.band(xOf(inOld.start), xOf(inOld.end()), top, xOf(inNew.start), xOf(inNew.end()), top + BandHeight,
-                     colour);
+        const double left = xOf(frames.start);
+        return {left, std::max(left + 0.3, xOf(frames.end()))};
+    }
+
+    /// Draws stretches that touch as one.
+    void drawBoxes(std::vector<Stretch> stretches, double top, const PdfColour& colour)
+    {
+        std::sort(stretches.begin(), stretches.end(),
+                  [](const Stretch& a, const Stretch& b) { return a.left < b.left; });
+        for (std::size_t first = 0; first < stretches.size();) {
+            double right = stretches[first].right;
+            std::size_t next = first + 1;
+            for (; next < stretches.size() && stretches[next].left <= right; ++next)
+                right = std::max(right, stretches[next].right);
+            m_pages.box(stretches[first].left, top, right - stretches[first].left, StripHeight, colour);
+            first = next;
+        }
+    }
+
+    void drawBand(const Band& band, double top)
+    {
+        m_pages.band(xOf(band.inOld.start), xOf(band.inOld.end()), top, xOf(band.inNew.start), xOf(band.inNew.end()),
+                     top + BandHeight, band.colour);
     }
 
     void drawPicture(double top)
@@ -174,24 +211,20 @@ private:
         const double bandTop = oldTop + StripHeight;
         const double newTop = bandTop + BandHeight;
         m_pages.text(Margin, oldTop - 4, "old cut", SmallFont, Dim);
-        m_pages.text(Margin, newTop + StripHeight + 10, "new cut", SmallFont, Dim);
         drawLegend(newTop + StripHeight + 10);
         drawBox({0, m_document.notes.oldCut().length()}, oldTop, Kept);
         drawBox({0, m_document.notes.newCut().length()}, newTop, Kept);
-        std::vector<FrameSpan> moves;
-        for (const core::ReelNotes& reel : m_document.notes.reels()) {
-            for (const NoteEntry& entry : reel.entries) {
-                if (entry.step() != nullptr && entry.step()->action == core::StepAction::Move)
-                    moves.push_back(*entry.step()->changes.front().inNew);
-            }
+        std::vector<Band> bands = allBands();
+        std::string below = "new cut";
+        if (bands.size() > MostBands) {
+            below += concatenated(
+                {", the ", std::to_string(MostBands), " longest of ", std::to_string(bands.size()), " bands"});
+            keepLongest(bands);
         }
-        std::sort(moves.begin(), moves.end(), [](const FrameSpan& a, const FrameSpan& b) { return a.start < b.start; });
-        for (const bool drawsMoves : {false, true}) {
-            for (const core::ReelNotes& reel : m_document.notes.reels()) {
-                for (const NoteEntry& entry : reel.entries)
-                    drawEntry(entry, moves, drawsMoves, oldTop, newTop);
-            }
-        }
+        m_pages.text(Margin, newTop + StripHeight + 10, below, SmallFont, Dim);
+        for (const Band& band : bands)
+            drawBand(band, bandTop);
+        drawChanges(oldTop, newTop);
         if (m_document.notes.reels().size() > 1)
             drawReelStarts(oldTop, newTop);
     }
@@ -228,33 +261,98 @@ private:
         }
     }
 
-    void drawEntry(const NoteEntry& entry, const std::vector<FrameSpan>& moves, bool drawsMoves, double oldTop,
-                   double newTop)
+    /// What the steps take out of the old strip and put into the new one.
+    void drawChanges(double oldTop, double newTop)
     {
-        const double bandTop = oldTop + StripHeight;
-        if (const core::KeptStretch* const kept = entry.kept()) {
-            const auto after =
-                std::upper_bound(moves.begin(), moves.end(), kept->newStart,
-                                 [](std::int32_t frame, const FrameSpan& move) { return frame < move.start; });
-            const bool isMoved = after != moves.begin() && kept->newStart < (after - 1)->end();
-            if (isMoved == drawsMoves)
-                drawBand({kept->oldStart, kept->length}, {kept->newStart, kept->length}, bandTop,
-                         isMoved ? Moved : Band);
-            return;
+        std::vector<Stretch> lifted;
+        std::vector<Stretch> inserted;
+        std::vector<Stretch> versions;
+        for (const core::ReelNotes& reel : m_document.notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                const core::NoteStep* const step = entry.step();
+                if (step == nullptr || step->action == core::StepAction::Move)
+                    continue;
+                for (const FrameSpan& removed : step->removedFrames)
+                    lifted.push_back(stretchOf(removed));
+                if (step->inserted.length > 0)
+                    (step->action == core::StepAction::Relabel ? versions : inserted)
+                        .push_back(stretchOf(step->inserted));
+            }
         }
-        if (entry.step() == nullptr)
+        drawBoxes(std::move(lifted), oldTop, Lifted);
+        drawBoxes(std::move(inserted), newTop, Inserted);
+        drawBoxes(std::move(versions), newTop, Version);
+    }
+
+    /// In the new cut, in order.
+    std::vector<FrameSpan> spansOfMoves() const
+    {
+        std::vector<FrameSpan> moves;
+        for (const core::ReelNotes& reel : m_document.notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                if (entry.step() != nullptr && entry.step()->action == core::StepAction::Move)
+                    moves.push_back(*entry.step()->changes.front().inNew);
+            }
+        }
+        std::sort(moves.begin(), moves.end(), [](const FrameSpan& a, const FrameSpan& b) { return a.start < b.start; });
+        return moves;
+    }
+
+    /// In the order in which they are drawn: what has moved lies over what stays.
+    std::vector<Band> allBands() const
+    {
+        const std::vector<FrameSpan> moves = spansOfMoves();
+        std::vector<Band> bands;
+        std::vector<Band> over;
+        for (const core::ReelNotes& reel : m_document.notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                if (const core::KeptStretch* const kept = entry.kept()) {
+                    const bool isMoved = isIn(moves, kept->newStart);
+                    (isMoved ? over : bands)
+                        .push_back({{kept->oldStart, kept->length},
+                                    {kept->newStart, kept->length},
+                                    isMoved ? Moved : Staying});
+                }
+                addDoubled(entry, over);
+            }
+        }
+        bands.insert(bands.end(), over.begin(), over.end());
+        return bands;
+    }
+
+    /// Whether one of the spans, which are in order, has the frame.
+    static bool isIn(const std::vector<FrameSpan>& spans, std::int32_t frame)
+    {
+        const auto after = std::upper_bound(spans.begin(), spans.end(), frame,
+                                            [](std::int32_t at, const FrameSpan& span) { return at < span.start; });
+        return after != spans.begin() && frame < std::prev(after)->end();
+    }
+
+    static void addDoubled(const NoteEntry& entry, std::vector<Band>& bands)
+    {
+        if (entry.step() == nullptr || entry.step()->action == core::StepAction::Move)
             return;
-        const core::NoteStep& step = *entry.step();
-        if (!drawsMoves || step.action == core::StepAction::Move)
-            return;
-        for (const FrameSpan& removed : step.removedFrames)
-            drawBox(removed, oldTop, Lifted);
-        if (step.inserted.length > 0)
-            drawBox(step.inserted, newTop, step.action == core::StepAction::Relabel ? Version : Inserted);
-        for (const PictureChange& change : step.changes) {
+        for (const PictureChange& change : entry.step()->changes) {
             if (change.kind == core::ChangeKind::Doubled)
-                drawBand(*change.inOld, *change.inNew, bandTop, Doubled);
+                bands.push_back({*change.inOld, *change.inNew, Doubled});
         }
+    }
+
+    /// Of equal ones the first. They stay in their order.
+    static void keepLongest(std::vector<Band>& bands)
+    {
+        std::vector<std::size_t> order(bands.size());
+        std::iota(order.begin(), order.end(), std::size_t{0});
+        std::stable_sort(order.begin(), order.end(), [&bands](std::size_t a, std::size_t b) {
+            return bands[a].inNew.length > bands[b].inNew.length;
+        });
+        order.resize(MostBands);
+        std::sort(order.begin(), order.end());
+        std::vector<Band> longest;
+        longest.reserve(order.size());
+        for (const std::size_t index : order)
+            longest.push_back(bands[index]);
+        bands = std::move(longest);
     }
 
     void addLargest()

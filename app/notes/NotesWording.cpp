@@ -278,6 +278,19 @@ std::string NotesWording::materialOf(const PictureChange& change) const
                          onScreen(source->toString(), m_document.notes.framerate())});
 }
 
+/// Names both versions where the shot has a new one.
+ChangeWords NotesWording::retimeWords(const PictureChange& change) const
+{
+    const std::string oldVersion = versionName(change.oldShot);
+    const std::string newVersion = versionName(change.newShot);
+    const auto printable = [](const std::string& name) { return toPrintable(name, MostCharactersOfAName).text; };
+    const bool isNewVersion = oldVersion != newVersion;
+    return {"speed " + percent(change.oldShot->signedSpeed()) + " now " + percent(change.newShot->signedSpeed()) + " %",
+            isNewVersion ? printable(newVersion) : nameOf(change.newShot),
+            concatenated({"was ", isNewVersion ? printable(oldVersion) + ", " : "", timecode(change.inOld->length),
+                          " long, is ", timecode(change.inNew->length), ", ", materialOf(change)})};
+}
+
 ChangeWords NotesWording::describe(const PictureChange& change) const
 {
     const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
@@ -312,11 +325,7 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
     case ChangeKind::Doubled:
         return {"once more " + length, name, "stood once in the old cut" + oldPlace()};
     case ChangeKind::Retimed:
-        return {"speed " + percent(change.oldShot->signedSpeed()) + " now " + percent(change.newShot->signedSpeed()) +
-                    " %",
-                name,
-                concatenated({"was ", timecode(change.inOld->length), " long, is ", timecode(change.inNew->length),
-                              ", ", materialOf(change)})};
+        return retimeWords(change);
     case ChangeKind::VersionChanged:
         return {"was " + toPrintable(versionName(change.oldShot), 28).text,
                 toPrintable(versionName(change.newShot), MostCharactersOfAName).text,

@@ -89,6 +89,7 @@ public:
 private:
     std::string versionName(const core::EventBase* shot) const;
     std::string materialOf(const core::PictureChange& change) const;
+    ChangeWords retimeWords(const core::PictureChange& change) const;
     std::string transitionText(const core::PictureChange& change) const;
     void addDoubts(bool isNew, std::vector<std::string>& lines) const;
     void addUnread(bool isNew, std::vector<std::string>& lines) const;

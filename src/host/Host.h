@@ -27,6 +27,10 @@
 #include <string>
 #include <vector>
 
+namespace cadrel::core {
+struct FrameRange;
+} // namespace cadrel::core
+
 namespace Velmark {
 class IActionManager;
 } // namespace Velmark
@@ -187,6 +191,8 @@ private:
     void tellDropped(const std::vector<std::int32_t>& actions);
     /// Result::Cancelled when the user has cancelled it and it was taken back.
     util::Result::Type runCadrel();
+    /// Throws when the run couldn't be taken back with its note.
+    void noteRun(Project& project, const core::FrameRange& allowed, Velmark::IEditTransaction& transaction);
     util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                   std::uint32_t options);
     /// With `leaving` the preview is switched off afterwards, also when it fails.

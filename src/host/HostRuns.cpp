@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
+#include "core/protect/RunRecord.h"
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
@@ -13,6 +14,7 @@
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
 #include "host/undo/PreviewEventsStep.h"
+#include "host/undo/RunNoteStep.h"
 #include "host/video/ProjectVideo.h"
 #include "host/video/VideoWriting.h"
 #include "util/FilledText.h"
@@ -183,10 +185,12 @@ Result::Type Host::runCadrel()
         return Result::NoProject;
     Project& project = *held;
     const core::EventList& changeList = project.model().changeEdl();
-    if (m_runBounds)
-        m_restricted.emplace(project.model().settings(), *m_runBounds);
     VideoWriting video = VideoWriting::Done;
     const Result::Type result = withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
+        // What the user lets change; the bounds leave out what stays as it is.
+        const core::FrameRange allowed = core::RunRecord::allowedBy(project.model().settings());
+        if (m_runBounds)
+            m_restricted.emplace(project.model().settings(), *m_runBounds);
         Counted<IActionManager> actions; // once the user has cancelled
         EntryName name = Apply;
         requireSuccess(edit(project, name, [&](IEditTransaction& transaction) {
@@ -209,6 +213,8 @@ Result::Type Host::runCadrel()
             double end = 0.0;
             project.getApplyRange(start, end);
             project.closeRange(isOnlySelected(project.model().settings()), start, end);
+            requireActive(project);
+            core::RunRecord::addRun(project.model(), allowed);
         }));
         if (actions) {
             takeBack(project, *actions);
@@ -219,6 +225,17 @@ Result::Type Host::runCadrel()
     if (result == Result::Ok)
         tellOfOmissions(project, video);
     return result;
+}
+
+/// The note has a step of its own, as nobody hears where the host refuses that of the model.
+void Host::noteRun(Project& project, const core::FrameRange& allowed, IEditTransaction& transaction)
+{
+    requireActive(project);
+    const std::optional<Document> document = activeDocument();
+    if (!document)
+        throw Result::NoProject;
+    requireOk(transaction.addStep(makeCounted<RunNoteStep>(document->model).get()));
+    core::RunRecord::addRun(*document->model, allowed);
 }
 
 Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,

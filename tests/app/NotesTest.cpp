@@ -422,6 +422,29 @@ TEST(Notes, ARetimedShotTellsItsLengthsItsRollAndItsSource)
         << text;
 }
 
+TEST(Notes, ARetimedShotOfANewVersionNamesBothVersions)
+{
+    const auto shot = [](const char* version, const char* source) {
+        const std::string name = "VFX_0310_" + std::string(version) + "_comp";
+        return std::regex_replace(oldCut(), std::regex("A002  V  C  11:00:00:12 11:00:10:12"),
+                                  name + "  V  C  " + source);
+    };
+    const std::string from = shot("v012", "11:00:00:12 11:00:10:12");
+    const std::string to = shot("v013", "11:00:00:12 11:00:05:12");
+    const auto expectLines = [](const Outcome& notes, const std::string& lines) {
+        EXPECT_NE(notes.out.find(lines), std::string::npos) << notes.out << notes.err;
+    };
+
+    expectLines(Cuts(from, to).notes({"--vfx", "VFX_****_v,_comp"}),
+                "      speed 100 now 50 %                 VFX_0310_v013_comp\n"
+                "        was VFX_0310_v012_comp, 00:00:10:00 long, is 00:00:10:00, roll\n"
+                "        VFX_0310_v013_comp, source 11:00:00:12\n");
+    expectLines(Cuts(from, shot("v012", "11:00:00:12 11:00:05:12")).notes({"--vfx", "VFX_****_v,_comp"}),
+                "      speed 100 now 50 %                 TWO\n"
+                "        was 00:00:10:00 long, is 00:00:10:00, roll VFX_0310_v012_comp, source\n"
+                "        11:00:00:12\n");
+}
+
 TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
 {
     std::string sound;

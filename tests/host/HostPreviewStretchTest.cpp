@@ -519,6 +519,29 @@ TEST_P(HostPreviewStretchTest, TakesAwayNothingOfTheFilmForARecordThatIsDamaged)
     }
 }
 
+TEST_P(HostPreviewStretchTest, LeavesCopiesOfAMediumThatWasRelinkedUnlessItIsTakenBack)
+{
+    auto& medium = host.addMedia(u"/sound/take 1.wav", 60.0);
+    auto& moved = host.addMedia(u"/other disk/take 1.wav", 60.0);
+    const auto link = [&](standin::MediaClip& clip) {
+        for (const Node& event : standin::tests::childrenOf(*track)) {
+            if (event->getName() == std::u16string(u"one"))
+                dynamic_cast<standin::ClipEvent&>(*event).setClip(Counted<standin::MediaClip>::share(&clip));
+        }
+    };
+    link(medium);
+    previewAll();
+    link(moved);
+
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "one 86410-86420"}));
+
+    ASSERT_TRUE(host.undo());
+    link(medium);
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+    EXPECT_EQ(host.contentOf(track), film);
+}
+
 // The preview of another project from which a track was imported.
 
 TEST_P(HostPreviewStretchTest, LetsMemosFollowWhateverATrackAboveTheirsKeepsOfAnotherPreview)

@@ -4,6 +4,7 @@
 
 #include "core/cut/Cut.h"
 #include "core/notify/ChangeContext.h"
+#include "core/protect/RunRecord.h"
 #include "host/Host.h"
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
@@ -216,6 +217,80 @@ TEST_P(HostRunTest, CanBeMadeAgain)
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel", u"Apply Cadrel"}));
 }
 
+TEST_P(HostRunTest, IsNotedInTheModelAndItsUndoTakesTheNoteBack)
+{
+    host.conform();
+    const auto isDone = [this] {
+        const auto noted = core::RunRecord::find(host.model());
+        return noted && noted->haveCarriedOut(host.model().changeEdl(), true);
+    };
+
+    EXPECT_TRUE(isDone());
+    ASSERT_TRUE(host.undo());
+    EXPECT_FALSE(isDone());
+    ASSERT_TRUE(host.redo());
+    EXPECT_TRUE(isDone());
+}
+
+TEST_P(HostRunTest, IsNotedForWhatTheUserLetsChangeAndNotForTheBoundsOfItsRequest)
+{
+    host.settings().setRestrictRange(true);
+    host.settings().setPreserveMaterial(AdaptedHost::onClock(0.0), AdaptedHost::onClock(12.0));
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(5.0), AdaptedHost::onClock(10.0)}), Result::Ok);
+    host.idle();
+
+    const auto noted = core::RunRecord::find(host.model());
+    ASSERT_TRUE(noted);
+    const auto isDoneFrom = [&](double start, double end) {
+        const core::FrameRange range{static_cast<std::int32_t>(25 * AdaptedHost::onClock(start)),
+                                     static_cast<std::int32_t>(25 * AdaptedHost::onClock(end))};
+        return noted->haveCarriedOut(host.model().changeEdl(), true, range);
+    };
+    EXPECT_TRUE(isDoneFrom(0.0, 5.0));
+    EXPECT_TRUE(isDoneFrom(11.0, 12.0));
+    EXPECT_FALSE(isDoneFrom(12.0, 20.0));
+}
+
+TEST_P(HostRunTest, IsNotNotedWhenItFails)
+{
+    requestRun();
+    host.altered.hide(ClassId::ObjectList);
+    host.idle();
+
+    ASSERT_EQ(heard.results, Results{Result::HostObjectMissing});
+    EXPECT_FALSE(core::RunRecord::find(host.model()));
+}
+
+TEST_P(HostRunTest, IsNotNotedWhenTheUserCancelsIt)
+{
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (host.isEditOpen())
+            progress->cancel();
+    };
+    host.conform();
+
+    ASSERT_EQ(heard.results, Results{Result::Cancelled});
+    EXPECT_FALSE(core::RunRecord::find(host.model()));
+}
+
+TEST_P(HostRunTest, ANoteThatCannotBeReadDoesNotKeepItFromBeingDone)
+{
+    host.model().setProperty(core::PropertyKey::DoneRuns, core::Variant("no bytes of runs"));
+    host.conform();
+
+    EXPECT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_TRUE(core::RunRecord::find(host.model()));
+}
+
+TEST_P(HostRunTest, APreviewIsNoRun)
+{
+    host.preview(host.model().changeEdl());
+
+    ASSERT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_FALSE(core::RunRecord::find(host.model()));
+}
+
 //     film           0         10         20         30
 //     first run      |--- 2 ---|---- 1 ---|            markers of its own on "Destination"
 //     second run     |--- 2 ---|---- 1 ---|            and not a second time
@@ -426,6 +501,27 @@ TEST_P(HostRunTest, TellsWhatStandsOnTheTracksThatItChanges)
     EXPECT_EQ(material(), (Material{onFilm(0, 10), onFilm(10, 20), onFilm(30, 40)}));
     host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
     EXPECT_EQ(material(), Material());
+}
+
+TEST_P(HostRunTest, TellsOfEveryKindOfThingThatARunTakesAway)
+{
+    host.addPart(track, u"part", host.inHost(30.0), host.inHost(35.0));
+    const auto picture = host.addTrack(TypeWord::Video, u"VIDEO");
+    host.addClip(picture, u"shot", host.inHost(40.0), host.inHost(45.0));
+    const auto markers = host.addTrack(TypeWord::Marker, u"Notes");
+    host.addPointMarker(markers, u"note", host.inHost(50.0));
+    host.addRangeMarker(markers, u"scene", host.inHost(52.0), host.inHost(58.0));
+    host.addPoint(track, standin::Envelope::Curve::Volume, host.inHost(60.0), 0.5F);
+
+    auto material = host.adapter().getMaterial();
+    std::ranges::sort(material, {}, &core::SecondsRange::start);
+    ASSERT_EQ(material.size(), 7U);
+    const std::vector<std::pair<double, double>> expected{{0, 10},  {10, 20}, {30, 35}, {40, 45},
+                                                          {50, 50}, {52, 58}, {60, 60}};
+    for (std::size_t index = 0; index < expected.size(); ++index) {
+        EXPECT_DOUBLE_EQ(material[index].start, AdaptedHost::onClock(expected[index].first)) << index;
+        EXPECT_DOUBLE_EQ(material[index].end, AdaptedHost::onClock(expected[index].second)) << index;
+    }
 }
 
 TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)

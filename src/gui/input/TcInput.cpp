@@ -81,6 +81,15 @@ public:
             });
         });
     }
+    void mouseUp(const juce::MouseEvent& event) override
+    {
+        guardSystem([&] {
+            TextEditor::mouseUp(event);
+            // At a caret between two digits there would be no room for what is typed.
+            if (event.mouseWasClicked() && !event.mods.isPopupMenu())
+                selectAll();
+        });
+    }
     void performPopupMenuAction(int item) override
     {
         guardUser([&] { change([&] { TextEditor::performPopupMenuAction(item); }); });

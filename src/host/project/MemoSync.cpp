@@ -42,17 +42,6 @@ std::set<std::int64_t> idsOf(const std::vector<PlacedMemo>& memos)
     return ids;
 }
 
-/// Of those before a time, in seconds of the project's clock.
-std::set<std::int64_t> idsBefore(const PlacedMemos& memos, double end)
-{
-    std::set<std::int64_t> ids;
-    for (const PlacedMemo& memo : memos.all()) {
-        if (isBefore(memo.span.start, end))
-            ids.insert(memo.id);
-    }
-    return ids;
-}
-
 /// Which sides of a copy the user has edited.
 struct Edited {
     bool name;
@@ -83,18 +72,25 @@ bool isValidUnder(const core::Framerate& framerate, const core::EventBase& event
 /// The new ids that are given to memos of a track one after the other.
 class NewIds {
 public:
-    explicit NewIds(const Track& memos) : m_memos(memos) {}
+    /// They are above all that are on the track and above `taken`.
+    NewIds(const Track& memos, std::int64_t taken) : m_memos(memos), m_taken(taken) {}
 
     std::int64_t next()
     {
-        if (m_last == std::numeric_limits<std::int64_t>::max())
-            throw util::Result::OutOfRange;
-        m_last = m_last ? *m_last + 1 : m_memos.nextUserId();
+        m_last = m_last ? idAfter(*m_last) : std::max(m_memos.nextUserId(), idAfter(m_taken));
         return *m_last;
     }
 
 private:
+    static std::int64_t idAfter(std::int64_t id)
+    {
+        if (id == std::numeric_limits<std::int64_t>::max())
+            throw util::Result::OutOfRange;
+        return id + 1;
+    }
+
     const Track& m_memos;
+    std::int64_t m_taken;
     std::optional<std::int64_t> m_last;
 };
 
@@ -244,7 +240,7 @@ class MemoSync::Following {
 public:
     Following(const MemoSync& sync, const Track& memos, const Preview& preview, IEditTransaction& transaction)
         : m_sync(sync), m_memos(memos), m_preview(preview), m_adrift(idsOf(preview.adrift)), m_transaction(transaction),
-          m_newIds(memos)
+          m_newIds(memos, sync.m_knownIds.empty() ? 0 : *sync.m_knownIds.rbegin())
     {
     }
 
@@ -255,55 +251,116 @@ public:
             if (isBefore(memo.span.start, previewStart))
                 ++m_counts[memo.id];
         }
-        for (const Shown& shown : m_preview.shown) {
+        std::vector<Edits> edits;
+        for (const Shown& shown : m_preview.shown)
+            edits.push_back(editsOf(shown, m_sync.rememberedOf(shown)));
+        findTaken(edits, placed, previewStart);
+        for (std::size_t index = 0; index < edits.size(); ++index) {
+            const Shown& shown = m_preview.shown[index];
             if (hasChanged(shown.stretch.source)) {
                 placed = PlacedMemos(m_memos);
                 m_changed = CoveredRanges();
             }
-            followStretch(placed, shown, m_sync.rememberedOf(shown));
+            followStretch(placed, shown, edits[index]);
         }
     }
 
 private:
-    void followStretch(const PlacedMemos& placed, const Shown& shown, const Remembered* remembered)
+    /// What the user has done to the copies of a stretch.
+    struct Edits {
+        const Remembered* remembered; ///< null where nothing is known; then the rest is empty
+        CopiesThatWere gone;
+        std::vector<PlacedMemo> untouched;
+        std::vector<PlacedMemo> edited;
+    };
+    /// A copy that has left its stretch, as it was, and its memo: of several of its id the nearest to where the copy was.
+    struct Taken {
+        Memo before;
+        PlacedMemo memo;
+        double distance; ///< in seconds
+    };
+
+    static Edits editsOf(const Shown& shown, const Remembered* remembered)
     {
-        MemosById sources(sourcesOf(placed, shown, remembered), shown.stretch.source);
-        if (remembered)
-            followEdits(shown, sources, *remembered);
+        static const Remembered NoCopies;
+        Edits edits{remembered, CopiesThatWere(remembered ? *remembered : NoCopies), {}, {}};
+        if (!remembered)
+            return edits;
+        for (const PlacedMemo& copy : shown.copies)
+            (edits.gone.isStillThere(memoOf(copy.event)) ? edits.untouched : edits.edited).push_back(copy);
+        edits.gone.settle();
+        return edits;
+    }
+
+    /// Finds the memos that go with their copies to the source of another stretch. Of each id one copy has gone from a stretch
+    /// and one has come to a stretch.
+    void findTaken(const std::vector<Edits>& edits, const PlacedMemos& placed, double previewStart)
+    {
+        std::map<std::int64_t, int> goneCounts;
+        std::map<std::int64_t, int> editedCounts;
+        for (const Edits& each : edits) {
+            for (const Memo& copy : each.gone.rest())
+                ++goneCounts[copy.id];
+            for (const PlacedMemo& copy : each.edited)
+                editedCounts[copy.id] += m_sync.m_notFollowed.contains(memoOf(copy.event)) ? 0 : 1;
+        }
+        std::map<std::int64_t, std::pair<Memo, const Stretch*>> left;
+        for (std::size_t index = 0; index < edits.size(); ++index) {
+            for (const Memo& copy : edits[index].gone.rest()) {
+                if (goneCounts[copy.id] == 1 && editedCounts[copy.id] == 1)
+                    left.try_emplace(copy.id, copy, &m_preview.shown[index].stretch);
+            }
+        }
+        if (left.empty())
+            return;
+        for (const PlacedMemo& memo : placed.all()) {
+            const auto found = left.find(memo.id);
+            if (found == left.end() || !isBefore(memo.span.start, previewStart))
+                continue;
+            const auto& [before, stretch] = found->second;
+            if (!liesIn(memo.span, stretch->source))
+                continue;
+            const double distance = std::abs(memo.span.start - stretch->toSource(before.start));
+            const auto [taken, isFirst] = m_taken.try_emplace(memo.id, Taken{before, memo, distance});
+            if (!isFirst && distance < taken->second.distance)
+                taken->second = {before, memo, distance};
+        }
+    }
+
+    void followStretch(const PlacedMemos& placed, const Shown& shown, Edits& edits)
+    {
+        MemosById sources(sourcesOf(placed, shown, edits.remembered), shown.stretch.source);
+        if (edits.remembered)
+            followEdits(shown.stretch, sources, edits);
         else
             compare(shown, sources);
     }
 
     /// Several memos may have the same id, as attributes travel with what is pasted. Then each follows the copy that stood
     /// where the memo is shown.
-    void followEdits(const Shown& shown, MemosById& sources, const Remembered& remembered)
+    void followEdits(const Stretch& stretch, MemosById& sources, Edits& edits)
     {
-        const Stretch& stretch = shown.stretch;
         // Another copy of the same memo may have been edited, or the memo itself.
-        CopiesThatWere gone(remembered);
-        std::vector<PlacedMemo> edited = shown.copies;
-        std::erase_if(edited, [&](const PlacedMemo& copy) {
-            const bool isUntouched = gone.isStillThere(memoOf(copy.event));
-            if (isUntouched)
-                sources.take(copy.id, stretch.toSource(copy.span.start));
-            return isUntouched;
-        });
-        gone.settle();
-        std::erase_if(edited, [&](const PlacedMemo& copy) {
+        for (const PlacedMemo& copy : edits.untouched)
+            sources.take(copy.id, stretch.toSource(copy.span.start));
+        CopiesThatWere& gone = edits.gone;
+        std::erase_if(edits.edited, [&](const PlacedMemo& copy) {
             // One that was there already isn't another that has gone since.
             const Memo now = memoOf(copy.event);
-            const auto before = m_sync.m_notFollowed.contains(now) ? std::nullopt : gone.take(now);
-            return (before || hasOneMemo(copy)) && carryOver(copy, sources, stretch, before);
+            if (m_sync.m_notFollowed.contains(now))
+                return hasOneMemo(copy) && carryOver(copy, sources, stretch, std::nullopt);
+            const auto before = gone.take(now);
+            return (before || hasOneMemo(copy)) ? carryOver(copy, sources, stretch, before) : takeAlong(copy, stretch);
         });
         // What the user has written in the real programme meanwhile has no copy that he could have removed, and the memos of
         // those adrift stay.
         for (const Memo& removed : gone.rest()) {
-            if (m_adrift.contains(removed.id))
+            if (m_adrift.contains(removed.id) || m_taken.contains(removed.id))
                 continue;
             if (const auto memo = sources.take(removed.id, stretch.toSource(removed.start)))
                 remove(*memo);
         }
-        for (const PlacedMemo& copy : edited) {
+        for (const PlacedMemo& copy : edits.edited) {
             if (!isLeftOfRemoved(copy))
                 writeMemoOf(copy, stretch);
         }
@@ -338,7 +395,8 @@ private:
                MemoMark::keptBy(*copy.event.node()); // what was pasted from the real programme has none
     }
 
-    /// Whether the user has now removed the memo of a copy that he had edited before, while nobody followed.
+    /// Whether the user has removed the memo of a copy that he had edited before, while nobody followed. It comes back only
+    /// if he edits the copy again.
     bool isLeftOfRemoved(const PlacedMemo& copy) const
     {
         return !m_counts.contains(copy.id) && MemoMark::keptBy(*copy.event.node()) &&
@@ -364,7 +422,7 @@ private:
                 found.push_back(memo);
             else if (!isBefore(memo.span.start, stretch.source.end) && wasHere(memo))
                 found.push_back(memo);
-            else
+            else if (reachesInto(memo.span, stretch.source) || !isBefore(memo.span.start, stretch.source.end))
                 reaching.push_back(memo);
         });
         if (reaching.empty())
@@ -392,6 +450,21 @@ private:
         return memo.has_value();
     }
 
+    /// Whether the copy has come from another stretch, with its memo.
+    bool takeAlong(const PlacedMemo& copy, const Stretch& stretch)
+    {
+        const auto taken = m_taken.find(copy.id);
+        if (taken == m_taken.end() || !MemoMark::keptBy(*copy.event.node()))
+            return false;
+        auto& [before, memo, distance] = taken->second;
+        const Memo edited = memoOf(copy.event);
+        if (edited.name != before.name)
+            memo.event.setName(m_transaction, edited.name);
+        place(memo, stretch.toSource(copy.span));
+        markFollowed(copy.event);
+        return true;
+    }
+
     void carryOver(const HostEvent& copy, PlacedMemo& placed, const Stretch& stretch, const std::optional<Memo>& before)
     {
         HostEvent& memo = placed.event;
@@ -410,13 +483,18 @@ private:
         const SecondsRange mapped = stretch.toSource(SecondsRange{edited.start, edited.end});
         const double start = followed(ownStart, mapped.start);
         const double end = followed(ownEnd, mapped.end);
-        if (start == ownStart && (!memo.isRange() || end == ownEnd))
-            return;
+        if (start != ownStart || (memo.isRange() && end != ownEnd))
+            place(placed, {start, end});
+    }
+
+    void place(const PlacedMemo& placed, const SecondsRange& span)
+    {
+        HostEvent memo = placed.event;
         noteChange(placed.span);
-        memo.setStart(m_transaction, start);
+        memo.setStart(m_transaction, span.start);
         if (memo.isRange())
-            memo.setLength(m_transaction, end - start);
-        noteChange({start, std::max(start, memo.getEnd())});
+            memo.setLength(m_transaction, span.end - span.start);
+        noteChange({span.start, std::max(span.start, memo.getEnd())});
     }
 
     /// What was done to the memo itself is the later edit.
@@ -464,6 +542,7 @@ private:
     const Track& m_memos;
     const Preview& m_preview;
     std::set<std::int64_t> m_adrift;
+    std::map<std::int64_t, Taken> m_taken;        ///< by their ids
     std::map<std::int64_t, std::size_t> m_counts; ///< of the memos in the real programme, by their ids
     IEditTransaction& m_transaction;
     NewIds m_newIds;
@@ -509,16 +588,13 @@ void MemoSync::note(const PlacedMemos& placed, const Track& memos, const Preview
     std::map<std::int64_t, std::set<Memo>> ahead;
     const Preview preview = previewOf(placed, previewed);
     const auto edited = editedSince(memos, preview.shown);
-    const double previewStart = previewed.offset + previewed.moved;
-    const std::set<std::int64_t> ownIds = edited.empty() ? std::set<std::int64_t>() : idsBefore(placed, previewStart);
     for (const Shown& shown : preview.shown) {
         for (const PlacedMemo& copy : shown.copies) {
             const Memo memo = memoOf(copy.event);
-            const bool isEdited = edited.contains(copy.event.node());
-            const bool hadMemo = !isEdited || MemoMark::keptBy(*copy.event.node());
-            if (isEdited && (!hadMemo || ownIds.contains(copy.id))) {
+            if (edited.contains(copy.event.node())) {
                 notFollowed.insert(memo);
-                if (hadMemo)
+                // What was written there has no memo yet.
+                if (MemoMark::keptBy(*copy.event.node()))
                     ahead[copy.id].insert(memo);
                 continue;
             }
@@ -526,7 +602,7 @@ void MemoSync::note(const PlacedMemos& placed, const Track& memos, const Preview
             ids.insert(copy.id);
         }
     }
-    for (const auto& [id, memo] : onlyOnes(placed, previewStart, ahead)) {
+    for (const auto& [id, memo] : onlyOnes(placed, previewed.offset + previewed.moved, ahead)) {
         Behind behind{memo, memo, ahead.at(id)};
         if (const auto last = lastBehind.find(id); last != lastBehind.end())
             behind = laterThan(last->second, std::move(behind));

@@ -61,8 +61,8 @@ public:
     /// Throws Result::HostObjectMissing and Result::HostCallFailed.
     void follow(const Track& memos, const Previewed& previewed, Velmark::IEditTransaction& transaction);
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise. One that
-    /// was edited and that its memo hasn't followed isn't noted, so that it is followed the next time. But where the user has
-    /// removed the memo, it is: the memo comes back only if the copy is edited again. After a failure nothing is noted.
+    /// was edited and that its memo hasn't followed is followed the next time. But if the user has removed the memo by then, it
+    /// is written anew only once he edits the copy again. After a failure nothing is noted.
     void remember(const Track& memos, const Previewed& previewed);
     /// Whether the last note was of that track and of that preview. It holds for as long as nothing on the track changes.
     bool hasNoted(const Track& memos, const Previewed& previewed) const;

@@ -272,8 +272,9 @@ void Project::syncMemos(IEditTransaction& transaction)
         return;
     Track& memos = markerTrack(TrackRole::Memos);
     const MemoSync::Previewed shown = previewed();
-    memos.assignIds(0.0, shown.offset + shown.moved - timeOrigin());
     m_memoSync.follow(memos, shown, transaction);
+    // Only now, as they may get the id of one whose copy the user has just removed.
+    memos.assignIds(0.0, shown.offset + shown.moved - timeOrigin());
 }
 
 void Project::rememberMemos()

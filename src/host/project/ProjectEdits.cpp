@@ -155,8 +155,9 @@ std::vector<SecondsRange> Project::material()
         // Each run marks anew.
         if (isMarkerTrackOfRuns(track))
             continue;
-        for (const HostEvent& event : track.clipEvents()) {
-            const SecondsRange span = track.eventSpan(event);
+        // A run takes away all that stands on a track, of whatever kind.
+        for (const auto& event : childrenOf(*required(query<IProjectNode>(track.node())))) {
+            const SecondsRange span = track.eventSpan(HostEvent(track, event));
             stretches.push_back({origin + span.start, origin + span.end});
         }
         for (const auto& curve : curvesOf(*track.node())) {

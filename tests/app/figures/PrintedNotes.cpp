@@ -367,14 +367,17 @@ PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
         return {"unchanged " + time, withMore(name, moreShots), {}};
     if (kind == "doubled")
         return {"once more " + time, name, "stood once in the old cut" + at()};
-    if (kind == "retimed")
-        return {"speed " + percent(was) + " now " + percent(now) + " %", name,
-                "was " + length(change.at("old"), "frames") + " long, is " + length(change.at("new"), "frames") + ", " +
+    const char* const matched = m_notes.at("match") == "clip" ? "clip" : "roll";
+    if (kind == "retimed") {
+        const bool isSameVersion = was.at(matched) == now.at(matched);
+        return {"speed " + percent(was) + " now " + percent(now) + " %",
+                isSameVersion ? name : cutTo(now.at(matched), ColumnsOfAName),
+                "was " + (isSameVersion ? "" : cutTo(was.at(matched), ColumnsOfAName) + ", ") +
+                    length(change.at("old"), "frames") + " long, is " + length(change.at("new"), "frames") + ", " +
                     materialOf(change)};
-    if (kind == "version-changed") {
-        const char* const key = m_notes.at("match") == "clip" ? "clip" : "roll";
-        return {"was " + cutTo(was.at(key), 28), cutTo(now.at(key), ColumnsOfAName), {}};
     }
+    if (kind == "version-changed")
+        return {"was " + cutTo(was.at(matched), 28), cutTo(now.at(matched), ColumnsOfAName), {}};
     if (kind == "transition-added")
         return {wipeOrDissolve(now) + " frames added", name, {}};
     if (kind == "transition-removed")

@@ -188,6 +188,19 @@ TEST_F(TcInputTest, IsTypedFromTheLeft)
     EXPECT_EQ(frames().getHighlightedText(), "04");
 }
 
+TEST_F(TcInputTest, TypesOverTheDigitsOfAFieldThatIsClickedAgain)
+{
+    open(false);
+    hours().grabKeyboardFocus();
+    for (int time = 0; time < 2; ++time) {
+        window.click(hours());
+        EXPECT_EQ(hours().getHighlightedRegion(), (juce::Range<int>(0, 2)));
+    }
+
+    window.type("02");
+    EXPECT_EQ(shown(), "+02:00:00:00");
+}
+
 TEST_F(TcInputTest, IsTypedFromTheLeftOverNumbersThatDropFrameLeavesOut)
 {
     project.framerate = Framerate(30, true, 1);

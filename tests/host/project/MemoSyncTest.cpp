@@ -197,9 +197,10 @@ public:
     }
 
     /// What the user has selected is pasted there with all that it keeps.
-    TrackHost::Node paste(const TrackHost::Node& memo, double start)
+    TrackHost::Node paste(const TrackHost::Node& memo, double start) { return paste(memo, start, memo->getName()); }
+    /// The same under another name.
+    TrackHost::Node paste(const TrackHost::Node& memo, double start, const std::u16string& name)
     {
-        const std::u16string name = memo->getName();
         const double length = memo->getEnd(nullptr) - memo->getStart(nullptr);
         TrackHost::Node pasted;
         host.edit(u"Paste", [&] {
@@ -526,6 +527,21 @@ TEST_P(MemoSyncTest, AMemoThatOnlyReachesInIsNoOther)
     EXPECT_EQ(film(), (Content{"in 2-12", "cue 15", "out 18-29"}));
 }
 
+TEST_P(MemoSyncTest, AMemoThatEndsWhereTheSourceBeginsIsNotTheOneOfACopyOfItsId)
+{
+    const auto cue = addMemo(u"cue", 18.0, 19.0);
+    preview({tenSeconds()});
+    unfollowed([&] {
+        paste(cue, 9.0, u"pasted");
+        remove(cue);
+        move(copyOf(u"cue"), 30.0);
+    });
+
+    addCopy(u"splash", 39.0);
+
+    EXPECT_EQ(memoOf(u"pasted")->getStart(nullptr), PreviewedMemos::film(9.0));
+}
+
 TEST_P(MemoSyncTest, AMemoAtTheEndOfTheSourceIsNotInThePreview)
 {
     addMemo(u"cue", 12.0);
@@ -546,6 +562,38 @@ TEST_P(MemoSyncTest, AMemoCanMoveToTheStretchOfAnotherEvent)
     move(copyOf(u"cue"), 43.0);
 
     EXPECT_EQ(film(), Content{"cue 53"});
+}
+
+TEST_P(MemoSyncTest, AMemoThatMovesToTheStretchOfAnotherEventStaysTheSame)
+{
+    const auto cue = addMemo(u"cue", 12.0);
+    const auto loud = addMemo(u"loud", 52.0, 55.0);
+    const auto in = addMemo(u"in", 9.0, 13.0);
+    preview({tenSeconds(), event("01:00:50:00", "01:01:00:00", "01:00:40:00", "01:00:50:00")});
+    rename(cue, u"tick");
+    rename(loud, u"louder");
+
+    move(copyOf(u"cue"), 40.0);
+    EXPECT_EQ(film(), (Content{"in 9-13", "tick 50", "louder 52-55"}));
+    move(copyOf(u"loud"), 38.0);
+    EXPECT_EQ(film(), (Content{"in 9-13", "louder 18-20", "tick 50"}));
+    move(copyOf(u"in"), 45.0);
+    EXPECT_EQ(film(), (Content{"louder 18-20", "tick 50", "in 55-58"}));
+    EXPECT_EQ(memoOf(u"tick").get(), cue.get());
+    EXPECT_EQ(memoOf(u"louder").get(), loud.get());
+    EXPECT_EQ(memoOf(u"in").get(), in.get());
+}
+
+TEST_P(MemoSyncTest, AnotherMemoOfItsIdStaysWhenTheCopyOfOneMovesToTheStretchOfAnotherEvent)
+{
+    const auto cue = addMemo(u"cue", 12.0);
+    preview({tenSeconds(), event("01:00:50:00", "01:01:00:00", "01:00:40:00", "01:00:50:00")});
+    paste(cue, 65.0, u"pasted");
+
+    move(copyOf(u"cue"), 45.0);
+
+    EXPECT_EQ(film(), (Content{"cue 55", "pasted 65"}));
+    EXPECT_EQ(memoOf(u"pasted")->getStart(nullptr), PreviewedMemos::film(65.0));
 }
 
 TEST_P(MemoSyncTest, OfTwoEventsWithTheSameSourceTheOneThatWasEditedIsFollowed)
@@ -1159,10 +1207,10 @@ TEST_P(MemoSyncTest, AMemoThatWasRemovedWhereNobodyFollowedDoesNotReturnForAnEdi
     const auto loud = addMemo(u"loud", 15.0, 17.0);
     preview({tenSeconds()});
     unfollowed([&] {
-        rename(copyOf(u"cue"), u"tick");
-        remove(cue);
-        remove(loud);
         move(copyOf(u"loud"), 36.0);
+        remove(loud);
+        remove(cue);
+        rename(copyOf(u"cue"), u"tick");
     });
 
     addCopy(u"splash", 39.0);
@@ -1188,6 +1236,35 @@ TEST_P(MemoSyncTest, AMemoThatIsRemovedAfterItsCopyWasEditedWhereNobodyFollowedD
 
     rename(copyOf(u"tick"), u"tock");
     EXPECT_EQ(film(), (Content{"tock 12", "splash 19"}));
+}
+
+TEST_P(MemoSyncTest, AMemoThatWasWrittenWhereNobodyFollowedDoesNotGoWithTheCopyOfOneThatWasRemoved)
+{
+    addMemo(u"cue", 12.0);
+    const auto loud = addMemo(u"loud", 15.0);
+    preview({tenSeconds()});
+    unfollowed([&] {
+        remove(loud);
+        addMemo(u"new", 16.0);
+    });
+
+    remove(copyOf(u"loud"));
+
+    EXPECT_EQ(film(), (Content{"cue 12", "new 16"}));
+}
+
+TEST_P(MemoSyncTest, WhatIsWrittenInsteadOfAMemoThatWasShownTwiceStays)
+{
+    const auto cue = addMemo(u"cue", 12.0);
+    preview({tenSeconds(), event("01:00:10:00", "01:00:20:00", "01:01:00:00", "01:01:10:00")});
+
+    host.edit(u"Replace", [&] {
+        for (const auto& memo : {cue, copyOf(u"cue", 0), copyOf(u"cue", 1)})
+            requireOk(host.transaction()->remove(host.root(), memo.get()));
+        addCopy(u"splash", 35.0);
+    });
+
+    EXPECT_EQ(film(), Content{"splash 15"});
 }
 
 TEST_P(MemoSyncTest, ACopyThatIsEditedAfterItsMemoWasRemovedIsWrittenAnew)
@@ -1861,11 +1938,6 @@ private:
                 memo.before.name = memo.film->name;
             if (!wasBehind || side.place != old.place)
                 memo.before.place = memo.film->place;
-            // It is another memo there.
-            if (side.place.stretch != old.place.stretch) {
-                memo.film = side;
-                memo.group = ++m_groups;
-            }
         }
         (isOfCopy ? memo.copy : memo.film) = side;
         finish({index, isOfCopy});

@@ -5,6 +5,7 @@
 #include <X11/XKBlib.h>
 #include <X11/Xlib.h>
 #include <X11/extensions/XTest.h>
+#include <X11/keysym.h>
 
 #include <stdexcept>
 
@@ -57,14 +58,51 @@ void XUser::button(unsigned int number)
     XSync(m_display, False);
 }
 
-void XUser::click()
+void XUser::click(unsigned long held)
 {
-    button(1);
+    change(held, true);
+    button(Button1);
+    change(held, false);
+    XSync(m_display, False);
+}
+
+void XUser::doubleClick()
+{
+    click();
+    click();
+}
+
+void XUser::dragTo(int x, int y)
+{
+    XTestFakeButtonEvent(m_display, Button1, True, CurrentTime);
+    moveTo(x, y);
+    XTestFakeButtonEvent(m_display, Button1, False, CurrentTime);
+    XSync(m_display, False);
+}
+
+void XUser::rightClick()
+{
+    button(Button3);
 }
 
 void XUser::wheelUp()
 {
-    button(4);
+    button(Button4);
+}
+
+void XUser::wheelDown()
+{
+    button(Button5);
+}
+
+void XUser::type(std::string_view text)
+{
+    for (const char character : text) {
+        // The keysyms of these are their characters.
+        const KeySym symbol = static_cast<unsigned char>(character);
+        const bool isPlain = XkbKeycodeToKeysym(m_display, XKeysymToKeycode(m_display, symbol), 0, 0) == symbol;
+        press(symbol, isPlain ? 0 : XK_Shift_L);
+    }
 }
 
 void XUser::press(unsigned long key, unsigned long held, unsigned long heldToo)

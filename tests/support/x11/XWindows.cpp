@@ -6,7 +6,10 @@
 
 #include <X11/Xlib.h>
 #include <X11/Xutil.h>
+#include <png.h>
 
+#include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <stdexcept>
 
@@ -22,6 +25,11 @@ std::string nameOf(KeySym symbol)
         return "character " + std::to_string(symbol - Unicode);
     const char* const name = XKeysymToString(symbol);
     return name ? name : "key " + std::to_string(symbol);
+}
+
+Window windowOf(standin::NativeWindow& window)
+{
+    return static_cast<Window>(reinterpret_cast<std::uintptr_t>(window.parent()));
 }
 
 } // namespace
@@ -137,7 +145,7 @@ void XWindows::serve()
 
 void XWindows::destroy(standin::NativeWindow& window)
 {
-    XDestroyWindow(m_display, static_cast<Window>(reinterpret_cast<std::uintptr_t>(window.parent())));
+    XDestroyWindow(m_display, windowOf(window));
     XSync(m_display, False);
 }
 
@@ -147,6 +155,81 @@ unsigned long XWindows::colourAt(int x, int y) const
     const unsigned long colour = XGetPixel(image, 0, 0) & 0xffffffUL;
     XDestroyImage(image);
     return colour;
+}
+
+int XWindows::windowCount() const
+{
+    Window root = 0;
+    Window parent = 0;
+    Window* windows = nullptr;
+    unsigned count = 0;
+    XQueryTree(m_display, DefaultRootWindow(m_display), &root, &parent, &windows, &count);
+    const auto isShown = [this](Window window) {
+        XWindowAttributes attributes;
+        return XGetWindowAttributes(m_display, window, &attributes) != 0 && attributes.map_state == IsViewable;
+    };
+    const auto shown = std::count_if(windows, windows + count, isShown);
+    if (windows)
+        XFree(windows);
+    return static_cast<int>(shown);
+}
+
+/// Of the screen, so that menus are in it.
+class XWindows::Picture {
+public:
+    Picture(Display* display, Window window)
+    {
+        XWindowAttributes place;
+        XGetWindowAttributes(display, window, &place);
+        m_image = XGetImage(display, DefaultRootWindow(display), place.x, place.y, static_cast<unsigned>(place.width),
+                            static_cast<unsigned>(place.height), AllPlanes, ZPixmap);
+        if (!m_image)
+            throw std::runtime_error("the window isn't on the screen");
+    }
+    Picture(const Picture&) = delete;
+    Picture& operator=(const Picture&) = delete;
+    ~Picture() { XDestroyImage(m_image); }
+
+    int width() const { return m_image->width; }
+    int height() const { return m_image->height; }
+    std::vector<char> bytes() const
+    {
+        return {m_image->data, m_image->data + std::ptrdiff_t{m_image->bytes_per_line} * m_image->height};
+    }
+    /// Red, green and blue of each pixel, line by line.
+    std::vector<std::uint8_t> colours() const
+    {
+        std::vector<std::uint8_t> colours;
+        for (int y = 0; y < height(); ++y) {
+            for (int x = 0; x < width(); ++x) {
+                const unsigned long colour = XGetPixel(m_image, x, y);
+                for (const int shift : {16, 8, 0})
+                    colours.push_back(static_cast<std::uint8_t>(colour >> shift));
+            }
+        }
+        return colours;
+    }
+
+private:
+    XImage* m_image;
+};
+
+std::vector<char> XWindows::pixelsOf(standin::NativeWindow& window) const
+{
+    return Picture(m_display, windowOf(window)).bytes();
+}
+
+void XWindows::writePicture(standin::NativeWindow& window, const std::filesystem::path& file) const
+{
+    const Picture picture(m_display, windowOf(window));
+    const std::vector<std::uint8_t> colours = picture.colours();
+    png_image header{};
+    header.version = PNG_IMAGE_VERSION;
+    header.width = static_cast<png_uint_32>(picture.width());
+    header.height = static_cast<png_uint_32>(picture.height());
+    header.format = PNG_FORMAT_RGB;
+    if (png_image_write_to_file(&header, file.c_str(), 0, colours.data(), 0, nullptr) == 0)
+        throw std::runtime_error("can't write " + file.string());
 }
 
 } // namespace cadrel::tests

@@ -4,6 +4,7 @@
 
 #include "standin/window/WindowSystem.h"
 
+#include <filesystem>
 #include <map>
 #include <string>
 #include <vector>
@@ -37,9 +38,16 @@ public:
     void destroy(standin::NativeWindow& window);
     /// What the screen shows at a place, as 0xRRGGBB.
     unsigned long colourAt(int x, int y) const;
+    /// The windows on the screen that lie in no other, menus included.
+    int windowCount() const;
+    /// What the screen shows of a window of the host, menus included, as the server keeps it: to be compared.
+    std::vector<char> pixelsOf(standin::NativeWindow& window) const;
+    /// The same as a PNG file. Throws std::runtime_error when it can't be written.
+    void writePicture(standin::NativeWindow& window, const std::filesystem::path& file) const;
 
 private:
     class XWindow;
+    class Picture;
 
     _XDisplay* m_display;
     std::map<unsigned long, XWindow*> m_windows;
