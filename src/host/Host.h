@@ -5,6 +5,7 @@
 #include "core/conform/CadrelerBase.h"
 #include "core/edl/EventList.h"
 #include "core/notify/ChangeContextNotificationBase.h"
+#include "core/protect/RestrictedRange.h"
 #include "core/serialize/ByteArchive.h"
 #include "core/time/SecondsRange.h"
 #include "host/border/Teardown.h"
@@ -196,7 +197,9 @@ private:
                                   std::uint32_t options);
     /// With `leaving` the preview is switched off afterwards, also when it fails.
     util::Result::Type finishPreview(bool leaving);
-    /// Tell the user of what is left out: of the new video, and of what the change list carries over.
+    /// Tell the user of what is left out: of the new video, and of what the change list carries over. He may do anything
+    /// meanwhile.
+    static void tellOfOmissions(const Project& project, VideoWriting writing);
     static void tellOfVideo(VideoWriting writing);
     static void tellOfLeftOut(const Project& project);
 
@@ -246,7 +249,8 @@ private:
     std::shared_ptr<ProjectVideo> m_videoProvider; ///< never null
     bool m_processing = false;                     ///< from the begin of a transaction to the end of its commit
     bool m_runRequested = false;
-    std::optional<core::SecondsRange> m_runBounds; ///< of the run that was requested, where it has some
+    std::optional<core::SecondsRange> m_runBounds;     ///< of the run that was requested, where it has some
+    std::optional<core::RestrictedRange> m_restricted; ///< while a run with bounds goes on
     bool m_previewRequested = false;
     std::optional<std::int32_t> m_served; ///< the action of the request that is being carried out
     core::EventList m_previewEvents{core::ListKind::Change};

@@ -206,6 +206,51 @@ TEST_P(HostPreviewStretchTest, LeavesOtherTracksAsTheyAre)
     EXPECT_EQ(host.contentOf(track), film);
 }
 
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidOnTopOfOneAnotherInItsOrder)
+{
+    previewAll();
+    // The preview's stretch begins with the day, an hour before the film in it.
+    host.addSound(track, u"below", Day - 3605.0, Day - 3599.0);
+    host.addSound(track, u"above", Day - 3605.0, Day - 3602.0);
+    host.addSound(track, u"within", Day + 1.0, Day + 2.0);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track),
+              (Texts{"one 0-10", "two 10-20", "below 82795-82801", "above 82795-82798", "within 86401-86402"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesTheAutomationThatTheUserDrawsOnACurveOnWhichItHasWrittenNothing)
+{
+    using Curve = standin::Envelope::Curve;
+    using Points = std::vector<std::pair<double, float>>;
+    const auto pointsOf = [&](int32 number) {
+        Points points;
+        for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, number)))
+            points.emplace_back(point->getStart(nullptr), query<IAutomationPoint>(point)->getValue());
+        return points;
+    };
+    host.addPoint(track, Curve::Volume, host.inHost(5.0), 0.5F);
+    host.addPoint(track, Curve::Volume, host.inHost(7.0), 0.25F);
+    const Points before = pointsOf(Curve::Volume);
+    for (const auto& [number, isReopened] : {std::pair(Curve::Pan, false), std::pair(Curve::Mute, true)}) {
+        SCOPED_TRACE(number);
+        previewAll();
+        ASSERT_GT(pointsOf(Curve::Volume).size(), before.size());
+        const double offset = previewOffset() - host.origin;
+        host.addPoint(track, number, offset + 3603.0, 0.25F);
+        host.addPoint(track, number, offset + 3630.0, 0.75F);
+        const Points drawn = pointsOf(number);
+        if (isReopened)
+            reopen();
+
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(pointsOf(number), drawn);
+        EXPECT_EQ(pointsOf(Curve::Volume), before);
+    }
+}
+
 TEST_P(HostPreviewStretchTest, GivesWayToWhatTheUserHasLaidSinceThePreviewBefore)
 {
     adapter().setPreviewActive(true);
@@ -305,8 +350,13 @@ TEST_P(HostPreviewStretchTest, LeavesNoPointOfItsOwnWhoseValueIsRounded)
     }
 
     host.conform();
-    for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, volume)))
-        EXPECT_LT(point->getStart(nullptr), Day - host.origin);
+    // The curve falls by 0.2 in a second.
+    const auto left = standin::tests::childrenOf(*host.curveOf(track, volume));
+    ASSERT_EQ(left.size(), 2U);
+    EXPECT_NEAR(left[0]->getStart(nullptr), host.inHost(10.0), 1e-9);
+    EXPECT_NEAR(query<IAutomationPoint>(left[0])->getValue(), 0.436, 1e-6);
+    EXPECT_NEAR(left[1]->getStart(nullptr), host.inHost(11.04), 1e-9);
+    EXPECT_NEAR(query<IAutomationPoint>(left[1])->getValue(), 0.228, 1e-6);
     adapter().setPreviewActive(true);
     EXPECT_EQ(previewOffset(), Day);
 }

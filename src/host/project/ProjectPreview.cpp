@@ -10,6 +10,7 @@
 #include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
 #include "host/track/Instant.h"
+#include "velmark/Automation.h"
 #include "velmark/Editing.h"
 
 #include <algorithm>
@@ -64,19 +65,39 @@ std::vector<Node> pointsIn(IProjectNode& curve, const core::SecondsRange& stretc
     return points;
 }
 
-/// Takes off what the system hasn't written in a stretch. The record is null for a track that has written nothing there; all
-/// automation of one that has counts as written.
+/// With the events, those that begin together with one of them before a time, all in the order of their track. What is put
+/// back comes to lie on top of all that begins with it.
+std::vector<Node> withThoseBeside(const Track& track, const std::vector<Node>& events, double time)
+{
+    std::set<double> starts;
+    std::set<const IProjectNode*> wanted;
+    for (const Node& event : events) {
+        wanted.insert(event.get());
+        if (event->getStart(nullptr) < time)
+            starts.insert(event->getStart(nullptr));
+    }
+    if (starts.empty())
+        return events;
+    std::vector<Node> all = childrenOf(*required(query<IProjectNode>(track.node())));
+    std::erase_if(all, [&](const Node& event) {
+        return !wanted.contains(event.get()) && !starts.contains(event->getStart(nullptr));
+    });
+    return all;
+}
+
+/// Takes off what the system hasn't written in a stretch. The record is null for a track that has written nothing there. All
+/// automation on a curve on which something is written counts as the system's.
 void takeUsersOff(SparedContent& spared, const Track& track, const PreviewRecord* record,
                   const core::SecondsRange& stretch)
 {
     std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
     if (record)
         events = MemoSync::othersThan(*record, std::move(events));
-    spared.takeOff(track.container(), events);
-    if (record)
-        return;
-    for (const Node& curve : curvesOf(*track.node()))
-        spared.takeOff(curve, pointsIn(*curve, stretch));
+    spared.takeOff(track.container(), withThoseBeside(track, events, stretch.start));
+    for (const Node& curve : curvesOf(*track.node())) {
+        if (!record || !record->hasWrittenOn(required(query<IEnvelopeTrack>(curve))->curveNumber()))
+            spared.takeOff(curve, pointsIn(*curve, stretch));
+    }
 }
 
 } // namespace
