@@ -53,7 +53,7 @@ std::string projectFileIn(const std::string& path)
     try {
         return standin::ProjectFile::fileIn(path).string();
     } catch (const ProjectFileError& error) {
-        throw Failure{path, faultIn(error, path), "name the project's file"};
+        throw Failure{path, faultIn(error, path), "give the project file in it"};
     }
 }
 

@@ -213,8 +213,7 @@ Result::Type Host::runCadrel()
             double end = 0.0;
             project.getApplyRange(start, end);
             project.closeRange(isOnlySelected(project.model().settings()), start, end);
-            requireActive(project);
-            core::RunRecord::addRun(project.model(), allowed);
+            noteRun(project, allowed, transaction);
         }));
         if (actions) {
             takeBack(project, *actions);
