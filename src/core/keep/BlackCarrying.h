@@ -28,8 +28,8 @@ class BlackCarrying {
 public:
     /// `newLit` is where the new cut has a picture; `material` are the clips, markers and points on tracks that the run
     /// changes, in any order. All but `material` are borrowed.
-    BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLit, const Reels& reels, const FrameRanges& material,
-                  const Framerate& framerate, CarriedStretches& carried);
+    BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLit, const Reels& reels,
+                  const std::vector<FrameRange>& material, const Framerate& framerate, CarriedStretches& carried);
 
     /// What finds no room beside its picture or its reel goes where the change EDL carries it, if it does.
     void run(const std::vector<ChangeStretch>& changes);
@@ -62,7 +62,7 @@ private:
     void carryAroundReels();
     void carryAsChanged(const std::vector<ChangeStretch>& changes);
     std::vector<Surroundings> surroundings() const;
-    /// Along with a reel.
+    /// Carries what goes along with a reel, and notes what of it can't since no timecode names the place.
     void follow(const FrameRange& source, std::int32_t shift, const FrameRange& room);
     void carry(const FrameRange& source, std::int32_t shift, const FrameRange& room);
     FrameRanges roomIn(const FrameRange& destination) const;
