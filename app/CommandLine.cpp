@@ -67,7 +67,11 @@ Without -o and --in-place no project is written, and the report tells what would
 stored with the project: an option that isn't given is as it was in the last run. Ctrl-C takes the run back. With
 --json - only the JSON goes to standard output.
 
+PROJECT is a project of Cadrel's own or a session of Ardour 6 or 7; a folder stands for the only session in it. The
+result has the same form. A session is written beside the old one, where its sound is.
+
 Examples:
+  cadrel apply reel3.ardour --old reel3_v07.edl --new reel3_v12.edl -o reel3_v12.ardour
   cadrel apply reel3.stage --old reel3_v07.edl --new reel3_v12.edl -o reel3_v12.stage
   cadrel apply reel3.stage --old reel3_v07.edl --new reel3_v12.edl --notes reel3_notes.html
   cadrel apply reel3.stage --change reel3_change.edl --in-place
@@ -107,7 +111,8 @@ only the JSON goes to standard output, with all points and with times in seconds
 Examples:
   cadrel show reel3.stage
   cadrel show reel3.stage --track "DIA 1"
-  cadrel show reel3.stage --track Music --json -)";
+  cadrel show reel3.stage --track Music --json -
+  cadrel show reel3.stage --media)";
 
 /// In the order of ApplyOptions::Keep.
 constexpr std::array<const char*, 2> KeepWords{"all", "cut"};
@@ -373,6 +378,9 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
             ->excludes(newFiles);
     addResult(*apply, options.outputFile, options.replacing, "Where to write the project");
     apply->add_flag("--in-place", options.inPlace, "Replace the project itself")->excludes("--output");
+    apply->add_option("--fade", options.fade, "How long clips of a session fade where they were cut (64 samples)")
+        ->type_name("MS")
+        ->check(CLI::Range(0.0, 10000.0));
     addOutput(*apply, "--json", options.jsonFile, AllJsonHelp);
     CLI::Option* const notes = addOutput(*apply, "--notes", options.notesFile,
                                          "Also write change notes with what happened to the sound: .html, .pdf, .csv, "
@@ -444,11 +452,16 @@ CLI::App* addShow(CLI::App& program, ShowOptions& options)
 {
     CLI::App* const show = program.add_subcommand("show", "Show what is in a sound project");
     show->add_option("PROJECT", options.projectFile, "The project to show")->type_name("")->required();
-    show->add_option("--track", options.trackName,
-                     "Show only the tracks of that name; a folder stands for all that is in it")
-        ->check(isNamed)
-        ->type_name("NAME");
+    CLI::Option* const track =
+        show->add_option("--track", options.trackName,
+                         "Show only the tracks of that name; a folder stands for all that is in it")
+            ->check(isNamed)
+            ->type_name("NAME");
     addJson(*show, options.jsonFile, options.isReplacing, AllJsonHelp);
+    show->add_flag("--media", options.isMedia,
+                   "Show the files of the media pool instead: rate, length, what is missing")
+        ->excludes(track)
+        ->excludes("--json");
     show->footer(ShowHelp);
     return show;
 }

@@ -6,6 +6,7 @@
 #include "app/edl/Generation.h"
 #include "app/notes/NotesDocument.h"
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -29,8 +30,10 @@ struct ApplyOptions {
     NotesLayout notes;
     Keep keep = Keep::All;
     bool isKeepGiven = false;
-    bool isForced = false;   ///< goes on where the files don't seem to belong together
-    bool isFresh = false;    ///< without what earlier runs have stored in the project
+    bool isForced = false; ///< goes on where the files don't seem to belong together
+    bool isFresh = false;  ///< without what earlier runs have stored in the project
+    /// Of clips at new edges, in milliseconds; nothing for the length that is usual in the project's form.
+    std::optional<double> fade;
     bool inPlace = false;    ///< the result replaces the project
     bool summary = false;    ///< the totals alone
     bool listsClips = false; ///< what became of each clip

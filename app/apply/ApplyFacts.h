@@ -52,6 +52,7 @@ struct ApplyFacts {
     std::vector<core::SecondsRange> lost; ///< what goes although no picture stands there; by the project's clock
     std::string matchText;                ///< what the match rests on; empty where the names tell the shots apart
     std::vector<TrackComparison> tracks;
+    std::vector<std::string> staying;        ///< what no run moves in a project of its form, in words
     double seconds = 0.0;                    ///< that the run took
     std::string written;                     ///< the project file; empty for none
     std::vector<std::string> projectBackups; ///< the former file under its new name; empty for none

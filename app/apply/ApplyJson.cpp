@@ -71,6 +71,7 @@ ordered_json ApplyJson::toJson() const
     json["seconds"] = m_facts.seconds;
     json["tracks"] = std::move(tracks);
     json["markers"] = std::move(markers);
+    json["staying"] = m_facts.staying;
     json["written"] = m_facts.written.empty() ? ordered_json() : ordered_json(m_facts.written);
     const auto firstOf = [](const std::vector<std::string>& names) {
         return names.empty() ? ordered_json() : ordered_json(names.front());

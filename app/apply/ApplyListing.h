@@ -28,6 +28,7 @@ private:
     void printPassedOver(std::ostream& out) const;
     void printLost(std::ostream& out) const;
     void printClips(std::ostream& out) const;
+    void printStaying(std::ostream& out) const;
     void printWritten(std::ostream& out) const;
     void printTrackTotals(std::ostream& out) const;
 

@@ -24,6 +24,7 @@
 
 namespace cadrel::app {
 
+using standin::ProjectFile;
 using standin::ProjectFileChanged;
 using standin::ProjectFileError;
 using util::Result;
@@ -146,9 +147,19 @@ void HostedProject::endPreview()
 
 void HostedProject::apply()
 {
+    apply([this] { return m_host->startCadrel(); });
+}
+
+void HostedProject::applyWithin(const core::SecondsRange& bounds)
+{
+    apply([&] { return m_host->startCadrelWithin(bounds); });
+}
+
+void HostedProject::apply(const std::function<Result::Type()>& request)
+{
     // What a run that breaks off leaves would be further off.
     const std::optional<std::string> far = farContent(*m_project, clockOf(*m_project, m_file));
-    const Result::Type result = m_host->startCadrel();
+    const Result::Type result = request();
     if (result != Result::Ok)
         throw startFailure(result, m_file);
     const RunEnd end(*m_host);
@@ -158,6 +169,15 @@ void HostedProject::apply()
         throw Failure{m_file, *far + ", too far off for a run", "move it to its place, or remove it"};
     if (end.result() != Result::Ok)
         throw breakFailure(end.result(), m_file);
+}
+
+void HostedProject::requireTarget(const std::string& file) const
+{
+    try {
+        ProjectFile::requireWritable(*m_project, file);
+    } catch (const ProjectFileError& error) {
+        throw Failure{file, faultIn(error, file), "give another name"};
+    }
 }
 
 void HostedProject::save(const std::string& file, const std::optional<util::FileStamp>& expected)

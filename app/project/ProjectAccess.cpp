@@ -3,6 +3,7 @@
 #include "app/project/ProjectAccess.h"
 
 #include "app/console/Paths.h"
+#include "app/console/Terminal.h"
 #include "host/project/HostFramerate.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
@@ -16,9 +17,6 @@ namespace cadrel::app {
 
 using standin::ProjectFileError;
 
-namespace {
-
-/// The fault alone: the error begins with the name of the file, in as many bytes, as a failure does.
 std::string faultIn(const ProjectFileError& error, const std::string& file)
 {
     const std::string text = error.what();
@@ -26,14 +24,37 @@ std::string faultIn(const ProjectFileError& error, const std::string& file)
     return hasName ? text.substr(file.size() + 2) : text;
 }
 
-} // namespace
-
 void requireReadableProject(const std::string& file)
 {
     toWide(file);
     std::error_code ignored;
     if (!std::filesystem::is_regular_file(file, ignored) || access(file.c_str(), R_OK) != 0)
         throw unreadable(file, FileKind::Project);
+}
+
+standin::Project& readProject(const std::string& file, Terminal& terminal)
+{
+    // Deleting a long project node by node takes time; the end of the program frees it at once.
+    static standin::ChangeLog& log = *new standin::ChangeLog;
+    static standin::Project* project = nullptr;
+
+    requireReadableProject(file);
+    terminal.showProgress("reading " + fileNameOf(file));
+    try {
+        project = standin::ProjectFile::read(file, log).detach();
+    } catch (const standin::ProjectFileError& error) {
+        throw readingFailure(error, file);
+    }
+    return *project;
+}
+
+std::string projectFileIn(const std::string& path)
+{
+    try {
+        return standin::ProjectFile::fileIn(path).string();
+    } catch (const ProjectFileError& error) {
+        throw Failure{path, faultIn(error, path), "name the project's file"};
+    }
 }
 
 Failure readingFailure(const ProjectFileError& error, const std::string& file)

@@ -5,6 +5,7 @@
 #include "app/edl/GenerationReport.h"
 #include "standin/base/AttributeList.h"
 #include "standin/base/Utf16.h"
+#include "standin/project/ProjectForm.h"
 
 #include <utility>
 
@@ -56,8 +57,10 @@ ordered_json toJson(const Attribute& attribute)
 ordered_json attributesOf(const Node& node)
 {
     ordered_json attributes = ordered_json::object();
-    for (const auto& [key, attribute] : node.attributes())
-        attributes[key] = toJson(attribute);
+    for (const auto& [key, attribute] : node.attributes()) {
+        if (!key.starts_with(standin::ProjectForm::KeyPrefix))
+            attributes[key] = toJson(attribute);
+    }
     return attributes;
 }
 

@@ -8,6 +8,7 @@
 #include "host/track/TrackRole.h"
 #include "standin/base/AttributeList.h"
 #include "standin/base/Utf16.h"
+#include "standin/project/ProjectForm.h"
 #include "util/StringUtil.h"
 #include "velmark/Attributes.h"
 
@@ -94,6 +95,8 @@ std::string roleInWords(Velmark::int64 stored)
 /// What an attribute of Cadrel's own says to people, which may be nothing; null for another.
 std::optional<std::string> meaningOf(const std::string& key, const Attribute& attribute)
 {
+    if (key.starts_with(standin::ProjectForm::KeyPrefix))
+        return std::string();
     if (key == AttributeKey::Storage || key == AttributeKey::StorageChecksum || key == AttributeKey::EventUserId)
         return std::string();
     const auto* const number = std::get_if<Velmark::int64>(&attribute.value);

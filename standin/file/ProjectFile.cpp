@@ -2,11 +2,12 @@
 
 #include "standin/file/ProjectFile.h"
 
-#include "standin/file/FileFault.h"
-#include "standin/file/JsonDocument.h"
-#include "standin/file/ProjectReader.h"
-#include "standin/file/ProjectWriter.h"
+#include "standin/ardour/ArdourForm.h"
+#include "standin/project/FileFault.h"
 #include "standin/project/Project.h"
+#include "standin/project/ProjectForm.h"
+#include "standin/stage/ProjectReader.h"
+#include "standin/stage/ProjectWriter.h"
 #include "util/FileReplacement.h"
 #include "util/Result.h"
 
@@ -46,7 +47,7 @@ std::string contentOf(const fs::path& file)
     if (!fs::is_regular_file(status))
         fail(file.string(), "is no ordinary file");
     const std::uintmax_t size = fs::file_size(file, error);
-    if (!error && size > JsonDocument::LargestSize)
+    if (!error && size > ProjectFile::LargestSize)
         fail(file.string(), "is too large for a project");
 
     std::ifstream stream(file, std::ios::binary);
@@ -57,29 +58,87 @@ std::string contentOf(const fs::path& file)
     return content;
 }
 
+Counted<Project> parsed(std::string text, const fs::path& file, ChangeLog& log)
+{
+    if (ArdourForm::recognises(text))
+        return ArdourForm::read(std::move(text), file, log);
+    return ProjectReader::read(text, log);
+}
+
+/// Throws FileFault.
+std::string contentFor(const Project& project)
+{
+    return project.form() ? project.form()->textOf(project) : ProjectWriter::textOf(project);
+}
+
 } // namespace
+
+fs::path ProjectFile::fileIn(const fs::path& path)
+{
+    std::error_code error;
+    if (!fs::is_directory(path, error))
+        return path;
+    fs::path found;
+    for (fs::directory_iterator entry(path, error); !error && entry != fs::directory_iterator();
+         entry.increment(error)) {
+        if (entry->path().extension() != ArdourForm::Extension)
+            continue;
+        if (!found.empty())
+            fail(path.string(), "holds several sessions; name one of them");
+        found = entry->path();
+    }
+    if (error)
+        fail(path.string(), error.message());
+    if (found.empty())
+        fail(path.string(), "is a folder without a session");
+    return found;
+}
 
 Counted<Project> ProjectFile::read(const fs::path& file, ChangeLog& log)
 {
-    return parse(contentOf(file), file.string(), log);
+    std::string content = contentOf(file);
+    try {
+        Counted<Project> project = parsed(std::move(content), file, log);
+        if (project->form())
+            project->form()->requireFree(file);
+        return project;
+    } catch (const FileFault& fault) {
+        fail(file.string(), fault.what());
+    }
 }
 
 Counted<Project> ProjectFile::parse(std::string_view text, const std::string& name, ChangeLog& log)
 {
     try {
-        return ProjectReader::read(text, log);
+        return parsed(std::string(text), name, log);
     } catch (const FileFault& fault) {
         fail(name, fault.what());
     }
 }
 
-void ProjectFile::write(const Project& project, const fs::path& file, const std::optional<FileStamp>& expected)
+void ProjectFile::requireWritable(const Project& project, const fs::path& file)
 {
     try {
-        const std::string text = ProjectWriter::textOf(project);
+        if (!project.form())
+            return;
+        project.form()->requirePlace(file);
+        project.form()->requireFree(file);
+    } catch (const FileFault& fault) {
+        fail(file.string(), fault.what());
+    }
+}
+
+void ProjectFile::write(const Project& project, const fs::path& file, const std::optional<FileStamp>& expected)
+{
+    requireWritable(project, file);
+    try {
+        const ProjectForm* const form = project.form();
+        const std::string text = contentFor(project);
         FileReplacement replacement(file);
         replacement.write(text);
         replacement.commit(expected);
+        if (form)
+            form->wasWritten(file);
     } catch (const FileFault& fault) {
         fail(file.string(), std::string("this project can't be stored: ") + fault.what());
     } catch (const FileReplacement::TargetChanged&) {
@@ -92,7 +151,7 @@ void ProjectFile::write(const Project& project, const fs::path& file, const std:
 std::string ProjectFile::toText(const Project& project)
 {
     try {
-        return ProjectWriter::textOf(project);
+        return contentFor(project);
     } catch (const FileFault& fault) {
         throw ProjectFileError(std::string("this project can't be stored: ") + fault.what());
     }

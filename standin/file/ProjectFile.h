@@ -5,6 +5,7 @@
 #include "util/FileStamp.h"
 #include "velmark/Counted.h"
 
+#include <cstddef>
 #include <filesystem>
 #include <optional>
 #include <stdexcept>
@@ -28,16 +29,21 @@ public:
     using ProjectFileError::ProjectFileError;
 };
 
-/// The form in which projects are stored: JSON, described in docs/project-file.md. The same project always gives the same
-/// bytes, and a project that was read from them gives them again.
+/// Projects in files. In which form one is stored is told by its content, and a project is written in the form in which it
+/// was read. The same project always gives the same bytes.
 class ProjectFile {
 public:
-    static constexpr const char* Extension = ".stage";
+    /// No project's file is larger than this, in bytes.
+    static constexpr std::size_t LargestSize = std::size_t{1} << 31U;
 
+    /// The only session in a folder, and any other path itself. Throws ProjectFileError for a folder with none or several.
+    static std::filesystem::path fileIn(const std::filesystem::path& path);
     /// Throws ProjectFileError. `log` is the host's.
     static Velmark::Counted<Project> read(const std::filesystem::path& file, ChangeLog& log);
     /// The same from the content of a file; `name` is for the errors alone.
     static Velmark::Counted<Project> parse(std::string_view text, const std::string& name, ChangeLog& log);
+    /// Throws ProjectFileError when a project of its form can't be written there, whatever is in it.
+    static void requireWritable(const Project& project, const std::filesystem::path& file);
     /// Replaces the file in one step: whatever happens, there is either the whole former file or the whole new one. With an
     /// `expected` stamp the file has to be as it was then; else ProjectFileChanged is thrown. Throws ProjectFileError.
     static void write(const Project& project, const std::filesystem::path& file,

@@ -3,6 +3,7 @@
 #include "standin/project/Project.h"
 
 #include "standin/base/FilePath.h"
+#include "standin/project/ProjectForm.h"
 #include "standin/project/Track.h"
 #include "velmark/Module.h"
 
@@ -144,6 +145,17 @@ double Project::lastEnd() const
 bool Project::accepts(const Node& child) const
 {
     return dynamic_cast<const Track*>(&child) != nullptr;
+}
+
+void Project::setPath(std::u16string path)
+{
+    m_path = std::move(path);
+    m_pool->setProjectFile(m_path);
+}
+
+void Project::setForm(std::unique_ptr<ProjectForm> form)
+{
+    m_form = std::move(form);
 }
 
 void Project::setFrameRate(const FrameRateInfo& info)

@@ -9,12 +9,14 @@
 #include "standin/project/MediaPool.h"
 #include "velmark/Project.h"
 
+#include <memory>
 #include <string>
 #include <vector>
 
 namespace standin {
 
 class MarkerTrack;
+class ProjectForm;
 class Track;
 
 /// A project: the root of the tracks, the media pool and the clock, and what the user sees of them.
@@ -51,7 +53,10 @@ public:
 
     /// Where it is stored; empty for a project that never was.
     const std::u16string& path() const { return m_path; }
-    void setPath(std::u16string path) { m_path = std::move(path); }
+    void setPath(std::u16string path);
+    /// Null for the host's own form.
+    ProjectForm* form() const { return m_form.get(); }
+    void setForm(std::unique_ptr<ProjectForm> form);
     const Velmark::FrameRateInfo& frameRate() const { return m_frameRate; }
     void setFrameRate(const Velmark::FrameRateInfo& info);
     double timeOrigin() const { return m_timeOrigin; }
@@ -96,6 +101,7 @@ private:
     Velmark::Counted<ProjectLink> m_link;
     UndoList m_undoList;
     std::u16string m_path;
+    std::unique_ptr<ProjectForm> m_form;
     Velmark::FrameRateInfo m_frameRate;
     double m_timeOrigin = 0.0;
     double m_endTime = 0.0;

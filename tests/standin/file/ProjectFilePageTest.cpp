@@ -2,7 +2,7 @@
 
 // The page that describes the project file.
 
-#include "standin/file/ProjectKeys.h"
+#include "standin/stage/ProjectKeys.h"
 #include "tests/standin/file/ProjectText.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/TreePaths.h"

@@ -1,0 +1,544 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "standin/ardour/ArdourReader.h"
+
+#include "standin/ardour/ListText.h"
+#include "standin/ardour/OwnStorage.h"
+#include "standin/base/Text.h"
+#include "standin/base/Utf16.h"
+#include "standin/project/AutomationPoint.h"
+#include "standin/project/ClipEvent.h"
+#include "standin/project/FileFault.h"
+#include "standin/project/Marker.h"
+#include "standin/project/Project.h"
+#include "standin/project/Track.h"
+#include "standin/stage/ProjectReader.h"
+
+#include <algorithm>
+#include <array>
+#include <charconv>
+#include <cstring>
+#include <optional>
+#include <system_error>
+
+using Velmark::Counted;
+using Velmark::FrameRateInfo;
+using Velmark::makeCounted;
+
+namespace standin {
+
+namespace {
+
+/// All that is in a text, but for the blanks between elements. What an entity stands for is read, but no entity that the
+/// text itself declares.
+constexpr unsigned int ParseAll = pugi::parse_cdata | pugi::parse_escapes | pugi::parse_eol | pugi::parse_doctype;
+/// No session nests its elements deeper than a handful of levels.
+constexpr int DeepestElement = 200;
+
+/// The first of the curves that have no fixed number.
+constexpr int FirstFreeCurve = 101;
+
+struct FrameRate {
+    std::string_view format;
+    double framesPerSecond;
+    unsigned int flags;
+};
+
+constexpr double PulledDown = 1000.0 / 1001.0;
+constexpr std::array FrameRates{
+    FrameRate{"timecode_23976", 24 * PulledDown, FrameRateInfo::Flag::PulledDown},
+    FrameRate{"timecode_24", 24, 0},
+    FrameRate{"timecode_24976", 25 * PulledDown, FrameRateInfo::Flag::PulledDown},
+    FrameRate{"timecode_25", 25, 0},
+    FrameRate{"timecode_2997", 30 * PulledDown, FrameRateInfo::Flag::PulledDown},
+    FrameRate{"timecode_2997drop", 30 * PulledDown, FrameRateInfo::Flag::PulledDown | FrameRateInfo::Flag::DropFrame},
+    FrameRate{"timecode_2997000", 29.97, 0},
+    FrameRate{"timecode_2997000drop", 29.97, FrameRateInfo::Flag::DropFrame},
+    FrameRate{"timecode_30", 30, 0},
+    FrameRate{"timecode_30drop", 30, FrameRateInfo::Flag::DropFrame},
+    FrameRate{"timecode_5994", 60 * PulledDown, FrameRateInfo::Flag::PulledDown},
+    FrameRate{"timecode_60", 60, 0},
+};
+
+std::optional<SessionId> idIn(std::string_view text)
+{
+    SessionId id = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), id);
+    if (error != std::errc() || end != text.data() + text.size() || id < 0)
+        return std::nullopt;
+    return id;
+}
+
+SessionId idOf(const pugi::xml_node& node)
+{
+    const std::optional<SessionId> id = idIn(node.attribute("id").value());
+    if (!id)
+        throw FileFault(quoted(node.name()), "has the id " + quoted(node.attribute("id").value()) + ", which is none");
+    return *id;
+}
+
+std::u16string textOf(std::string_view text)
+{
+    if (!isWellFormed(text) || text.find('\0') != text.npos)
+        throw FileFault("the session has a name that isn't UTF-8: " + quoted(text));
+    return toUtf16(text);
+}
+
+/// Whether one of the words that are parted by commas is `flag`.
+bool hasFlag(std::string_view flags, std::string_view flag)
+{
+    for (std::size_t begin = 0; begin <= flags.size();) {
+        const std::size_t end = std::min(flags.find(',', begin), flags.size());
+        if (flags.substr(begin, end - begin) == flag)
+            return true;
+        begin = end + 1;
+    }
+    return false;
+}
+
+void setId(Node& node, const char* key, SessionId id)
+{
+    node.setAttribute(key, Attribute{Velmark::int64{id}, true});
+}
+
+/// The name of a marker without that of its track.
+std::u16string markerName(std::string_view location, const Track& track)
+{
+    const std::u16string name = textOf(location);
+    const std::u16string prefix = ownLocationName(track.name(), u"");
+    if (name == prefix)
+        return std::u16string();
+    const std::u16string longer = ownLocationName(track.name(), u" ");
+    const std::size_t size = longer.size() - 1;
+    return name.starts_with(longer.substr(0, size)) ? name.substr(size) : name;
+}
+
+class IdCollector : public pugi::xml_tree_walker {
+public:
+    bool for_each(pugi::xml_node& node) override
+    {
+        if (depth() > DeepestElement)
+            throw FileFault("the session nests its elements too deep");
+        const pugi::xml_attribute attribute = node.attribute("id");
+        if (attribute)
+            largest = std::max(largest, idIn(attribute.value()).value_or(0));
+        return true;
+    }
+
+    SessionId largest = 0;
+};
+
+} // namespace
+
+ArdourReader::ArdourReader(std::string text, const std::filesystem::path& file) : m_file(file)
+{
+    m_session.text = std::move(text);
+    const pugi::xml_parse_result result =
+        m_document.load_buffer(m_session.text.data(), m_session.text.size(), ParseAll, pugi::encoding_utf8);
+    if (!result) {
+        const auto offset = std::clamp<std::ptrdiff_t>(result.offset, 0, std::ssize(m_session.text));
+        const auto line = std::count(m_session.text.begin(), m_session.text.begin() + offset, '\n') + 1;
+        throw FileFault("line " + std::to_string(line), "isn't XML: " + std::string(result.description()));
+    }
+    for (const pugi::xml_node& node : m_document.children()) {
+        if (node.type() == pugi::node_doctype)
+            throw FileFault("the file declares a document type, which no session does");
+    }
+    m_root = m_document.document_element();
+    if (std::strcmp(m_root.name(), "Session") != 0)
+        throw FileFault("is XML, but no session of Ardour");
+    const int version = m_root.attribute("version").as_int();
+    if (version > NewestVersion) {
+        throw FileFault("version", "is " + std::to_string(version) +
+                                       ": written by a newer Ardour than 7, which can't be "
+                                       "read yet");
+    }
+    if (version < OldestVersion) {
+        throw FileFault("version", "is " + quoted(m_root.attribute("version").value()) +
+                                       ": older than Ardour 6; open the session in Ardour 7 and save it there");
+    }
+    m_session.clock = SessionClock(m_root);
+    m_session.element = rangeOf(m_root);
+}
+
+TextRange ArdourReader::rangeOf(const pugi::xml_node& node) const
+{
+    return standin::rangeOf(node, m_session.text);
+}
+
+std::string ArdourReader::optionOf(const char* name) const
+{
+    return m_root.child("Config").find_child_by_attribute("Option", "name", name).attribute("value").value();
+}
+
+Counted<Project> ArdourReader::read(ChangeLog& log)
+{
+    findIds();
+    findExtra();
+    const Counted<Project> project =
+        m_session.ownText.empty() ? makeCounted<Project>(log) : ProjectReader::read(m_session.ownText, log);
+    readClock(*project);
+    readSources(*project);
+    readRoutes(*project);
+    dropGoneTracks(*project);
+    readLocations(*project);
+    m_session.contentEnd = contentEnd(*project);
+    project->showChanges();
+    project->clearChanges();
+    return project;
+}
+
+void ArdourReader::findIds()
+{
+    IdCollector collector;
+    m_document.traverse(collector);
+    m_session.largestId = std::max(collector.largest, idIn(m_root.attribute("id-counter").value()).value_or(0));
+    constexpr SessionId Furthest = SessionId{1} << 62;
+    if (m_session.largestId > Furthest)
+        throw FileFault("the session has an id beyond all others, after which no new ones can come");
+}
+
+void ArdourReader::findExtra()
+{
+    const pugi::xml_node extra = m_root.child("Extra");
+    if (!extra)
+        return;
+    m_session.extra = rangeOf(extra);
+    const pugi::xml_node own = extra.child("Cadrel");
+    if (!own)
+        return;
+    m_session.own = rangeOf(own);
+    m_session.ownText = own.text().get();
+    for (std::string_view rest = own.attribute("markers").value(); !rest.empty();) {
+        const std::string_view word = rest.substr(0, rest.find(' '));
+        m_session.ownMarkers.push_back(idIn(word).value_or(0));
+        rest.remove_prefix(std::min(word.size() + 1, rest.size()));
+    }
+}
+
+void ArdourReader::readClock(Project& project)
+{
+    const std::string format = optionOf("timecode-format");
+    const auto rate = std::ranges::find(FrameRates, format, &FrameRate::format);
+    if (rate == FrameRates.end())
+        throw FileFault("timecode-format", "is " + quoted(std::string_view(format)) + ", at which no timecode counts");
+    FrameRateInfo info;
+    info.framesPerSecond = rate->framesPerSecond;
+    info.flags = rate->flags;
+    project.setFrameRate(info);
+    project.setName(textOf(m_root.attribute("name").value()));
+
+    const std::string offset = optionOf("timecode-offset");
+    const auto samples = idIn(offset.empty() ? "0" : offset);
+    if (!samples)
+        throw FileFault("timecode-offset",
+                        "is " + quoted(std::string_view(offset)) + ", which is no number of samples");
+    const double seconds = m_session.clock.secondsOf(*samples);
+    // With the option on, timecode is behind the session's own time by so much.
+    project.setTimeOrigin(optionOf("timecode-offset-negative") == "0" ? seconds : -seconds);
+}
+
+void ArdourReader::readSources(Project& project)
+{
+    // How much of a source the regions know.
+    std::map<SessionId, double> lengths;
+    const auto measure = [&](const pugi::xml_node& region) {
+        const std::optional<SessionId> source = idIn(region.attribute("source-0").value());
+        if (!source || std::strcmp(region.attribute("type").value(), "audio") != 0)
+            return;
+        const std::string_view length = region.attribute("length").value();
+        const SessionClock& clock = m_session.clock;
+        const double end = clock.seconds(region.attribute("start").value()) +
+                           clock.seconds(length.substr(0, clock.hasUnits() ? length.find('@') : length.npos));
+        double& known = lengths[*source];
+        known = std::max(known, end);
+    };
+    for (const pugi::xml_node& region : m_root.child("Regions").children("Region"))
+        measure(region);
+    for (const pugi::xml_node& playlist : m_root.child("Playlists").children("Playlist")) {
+        for (const pugi::xml_node& region : playlist.children("Region"))
+            measure(region);
+    }
+
+    // Ardour names the folder of a session's sound after the session's own.
+    std::error_code ignored;
+    const std::filesystem::path session = std::filesystem::absolute(m_file, ignored).parent_path();
+    const std::filesystem::path folder = session / "interchange" / session.filename() / "audiofiles";
+    for (const pugi::xml_node& source : m_root.child("Sources").children("Source")) {
+        if (std::strcmp(source.attribute("type").value(), "audio") != 0)
+            continue;
+        const SessionId id = idOf(source);
+        // An absolute name replaces the folder.
+        const std::filesystem::path path = folder / source.attribute("name").value();
+        const auto clip = makeCounted<MediaClip>(MediaClip::Kind::Audio, textOf(path.string()), lengths[id]);
+        if (!m_clips.emplace(id, clip).second)
+            throw FileFault("Sources", "has two sources with the id " + std::to_string(id));
+        project.pool().add(clip);
+    }
+}
+
+void ArdourReader::readRoutes(Project& project)
+{
+    for (const pugi::xml_node& playlist : m_root.child("Playlists").children("Playlist")) {
+        if (!m_playlists.emplace(idOf(playlist), playlist).second)
+            throw FileFault("Playlists", "has two playlists with one id");
+    }
+    for (const pugi::xml_node& route : m_root.child("Routes").children("Route"))
+        readRoute(route, project);
+    for (const auto& [id, playlist] : m_playlists) {
+        if (!m_playlistsRead.contains(id) && std::strcmp(playlist.attribute("type").value(), "audio") == 0)
+            m_session.staying.push_back("the playlist " + quoted(playlist.attribute("name").value()));
+    }
+    for (const pugi::xml_node& playlist : m_root.child("UnusedPlaylists").children("Playlist"))
+        m_session.staying.push_back("the playlist " + quoted(playlist.attribute("name").value()));
+}
+
+void ArdourReader::readRoute(const pugi::xml_node& route, Project& project)
+{
+    const SessionId id = idOf(route);
+    const std::string name = route.attribute("name").value();
+    if (std::strcmp(route.attribute("default-type").value(), "audio") != 0 || route.attribute("midi-playlist")) {
+        m_session.staying.push_back("the MIDI track " + quoted(std::string_view(name)));
+        return;
+    }
+    // What Cadrel has stored of a track comes first, and so does its place.
+    Counted<Track> track;
+    for (Track* const candidate : project.allTracks()) {
+        if (candidate->kind() == Track::Kind::Audio && attributeId(*candidate, SessionKey::Route) == id)
+            track = Counted<Track>::share(candidate);
+    }
+    if (track)
+        track->remove();
+    else
+        track = Track::create(Track::Kind::Audio);
+    setId(*track, SessionKey::Route, id);
+    track->setName(textOf(name));
+    readLists(id, route, *track);
+
+    const pugi::xml_attribute ownPlaylist = route.attribute("audio-playlist");
+    if (ownPlaylist) {
+        const std::optional<SessionId> playlistId = idIn(ownPlaylist.value());
+        const auto playlist = playlistId ? m_playlists.find(*playlistId) : m_playlists.end();
+        if (playlist == m_playlists.end())
+            throw FileFault(quoted(std::string_view(name)),
+                            "plays the playlist " + quoted(ownPlaylist.value()) + ", which isn't there");
+        // One that tracks share moves once.
+        if (m_playlistsRead.insert(*playlistId).second) {
+            readPlaylist(id, playlist->second, *track);
+            // The elements of long playlists take more memory than all else together.
+            playlist->second.parent().remove_child(playlist->second);
+        }
+    }
+    const bool hasPoints = std::ranges::any_of(track->curves(), [](const auto& c) { return c.second->firstChild(); });
+    if (ownPlaylist || hasPoints)
+        track->insertInto(project);
+}
+
+void ArdourReader::readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track)
+{
+    ArdourSession::Playlist& read = m_session.playlists[route];
+    read.text = rangeOf(playlist);
+    for (const pugi::xml_node& region : playlist.children("Region")) {
+        if (std::strcmp(region.attribute("type").value(), "audio") == 0) {
+            readRegion(region, track);
+            read.regions.push_back(idOf(region));
+        }
+    }
+}
+
+void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
+{
+    const SessionId id = idOf(region);
+    const std::string name = region.attribute("name").value();
+    const SessionClock& clock = m_session.clock;
+    ArdourSession::Region read;
+    read.text = rangeOf(region);
+    const std::string_view length = region.attribute("length").value();
+    if (clock.hasUnits()) {
+        const std::size_t at = length.find('@');
+        if (at == length.npos)
+            throw FileFault(quoted(std::string_view(name)), "has the length " + quoted(length) + ", which is none");
+        read.position = clock.samples(length.substr(at + 1));
+        read.length = clock.endInSamples(length.substr(at + 1), length.substr(0, at)) - read.position;
+    } else {
+        read.position = clock.samples(region.attribute("position").value());
+        read.length = clock.samples(length);
+    }
+    read.start = clock.samples(region.attribute("start").value());
+    if (!m_session.regions.emplace(id, read).second)
+        throw FileFault(quoted(std::string_view(name)),
+                        "has the id " + std::to_string(id) + ", which is another region's");
+
+    const auto clip = m_clips.find(idIn(region.attribute("source-0").value()).value_or(-1));
+    if (clip == m_clips.end()) {
+        throw FileFault(name,
+                        "plays the source " + quoted(region.attribute("source-0").value()) + ", which isn't there");
+    }
+    const auto event = makeCounted<ClipEvent>();
+    event->setClip(clip->second);
+    event->setName(textOf(name));
+    setId(*event, SessionKey::Region, id);
+    event->setSourceOffset(clock.secondsOf(read.start));
+    event->setSpan(clock.secondsOf(read.position), clock.secondsOf(read.position + read.length));
+    event->insertInto(track);
+}
+
+void ArdourReader::readLists(SessionId route, const pugi::xml_node& node, Track& track)
+{
+    // A route holds lists in itself, in its panner and in its processors, at most a few levels below.
+    std::vector<pugi::xml_node> open{node};
+    int next = FirstFreeCurve;
+    while (!open.empty()) {
+        const pugi::xml_node parent = open.back();
+        open.pop_back();
+        for (const pugi::xml_node& child : parent.children()) {
+            if (std::strcmp(child.name(), "AutomationList") != 0) {
+                if (std::strcmp(child.name(), "Triggers") != 0 && std::strcmp(child.name(), "Extra") != 0)
+                    open.push_back(child);
+                continue;
+            }
+            if (!child.child("events"))
+                continue;
+            const std::string_view what = child.attribute("automation-id").value();
+            const std::string_view type = parent.parent().attribute("type").value();
+            int number = 0;
+            if (what == "gain" && type == "amp")
+                number = Envelope::Curve::Volume;
+            else if (what == "pan-azimuth")
+                number = Envelope::Curve::Pan;
+            else if (what == "mute")
+                number = Envelope::Curve::Mute;
+            if (number == 0 || m_session.lists.contains({route, number}))
+                number = next++;
+            readList(route, child, track, number);
+        }
+    }
+}
+
+void ArdourReader::readList(SessionId route, const pugi::xml_node& list, Track& track, int number)
+{
+    const SessionClock& clock = m_session.clock;
+    const std::vector<ListPoint> points = readPoints(list, clock);
+    std::vector<double> values;
+    for (const ListPoint& point : points)
+        values.push_back(point.value);
+    ArdourSession::List read{rangeOf(list), CurveScale(list.attribute("interpolation-style").value(), values), {}};
+    const auto add = [&](double seconds, double share) { read.points.emplace_back(seconds, share); };
+    for (const ListPoint& point : points) {
+        const double share = read.scale.toShare(point.value);
+        if (!read.points.empty()) {
+            const auto [before, shareBefore] = read.points.back();
+            if (read.scale.holds()) {
+                add(point.seconds, shareBefore);
+            } else if (point.isMusical && point.seconds > before) {
+                // What is straight over beats bends where the tempo changes.
+                const double first = clock.ticksAt(before);
+                const double last = clock.ticksAt(point.seconds);
+                for (const double bend : clock.bendsBetween(before, point.seconds))
+                    add(bend, std::lerp(shareBefore, share, (clock.ticksAt(bend) - first) / (last - first)));
+            }
+        }
+        add(point.seconds, share);
+    }
+    Envelope& curve = track.curve(number);
+    for (const auto& [seconds, share] : read.points) {
+        const auto point = makeCounted<AutomationPoint>();
+        point->setSpan(seconds, seconds);
+        point->setValue(share);
+        point->insertInto(curve);
+    }
+    m_session.lists.emplace(std::pair{route, number}, std::move(read));
+}
+
+void ArdourReader::dropGoneTracks(Project& project)
+{
+    std::set<SessionId> routes;
+    for (const pugi::xml_node& route : m_root.child("Routes").children("Route"))
+        routes.insert(idOf(route));
+    for (Track* const track : project.allTracks()) {
+        const SessionId route = attributeId(*track, SessionKey::Route);
+        if (route != 0 && !routes.contains(route))
+            track->remove();
+    }
+}
+
+void ArdourReader::readLocations(Project& project)
+{
+    const pugi::xml_node locations = m_root.child("Locations");
+    if (locations)
+        m_session.locationsElement = rangeOf(locations);
+    const SessionClock& clock = m_session.clock;
+    for (const pugi::xml_node& location : locations.children("Location")) {
+        const SessionId id = idOf(location);
+        const std::string_view flags = location.attribute("flags").value();
+        ArdourSession::Location read;
+        read.text = rangeOf(location);
+        read.isRange = !hasFlag(flags, "IsMark");
+        read.name = location.attribute("name").value();
+        read.start = clock.samples(location.attribute("start").value());
+        read.end = read.isRange ? clock.samples(location.attribute("end").value()) : read.start;
+        if (read.end < read.start)
+            throw FileFault(quoted(std::string_view(read.name)), "ends before it begins");
+        if (hasFlag(flags, "IsSessionRange")) {
+            m_session.sessionRange = read;
+            project.setProjectEnd(clock.secondsOf(read.end));
+        } else if (hasFlag(flags, "IsAutoLoop")) {
+            project.cycleLeft().setValue(0, clock.secondsOf(read.start));
+            project.cycleRight().setValue(0, clock.secondsOf(read.end));
+        } else if (!hasFlag(flags, "IsAutoPunch")) {
+            if (!m_session.locations.emplace(id, std::move(read)).second)
+                throw FileFault("Locations", "has two with the id " + std::to_string(id));
+            m_order.push_back(id);
+        }
+    }
+    placeOwnMarkers(project);
+    placeMarkersOfTheUser(project);
+}
+
+void ArdourReader::placeMarkersOfTheUser(Project& project)
+{
+    const SessionClock& clock = m_session.clock;
+    Counted<Track> markers;
+    for (Track* const track : project.allTracks()) {
+        if (attributeId(*track, SessionKey::Markers) != 0)
+            markers = Counted<Track>::share(track);
+    }
+    for (const SessionId id : m_order) {
+        const ArdourSession::Location& location = m_session.locations.at(id);
+        if (m_ownLocations.contains(id))
+            continue;
+        if (!markers) {
+            markers = Track::create(Track::Kind::Marker);
+            markers->setName(u"Markers");
+            setId(*markers, SessionKey::Markers, 1);
+            markers->insertInto(project);
+        }
+        const auto marker = makeCounted<Marker>(location.isRange);
+        marker->setName(textOf(location.name));
+        marker->setSpan(clock.secondsOf(location.start), clock.secondsOf(location.end));
+        setId(*marker, SessionKey::Location, id);
+        marker->insertInto(*markers);
+    }
+}
+
+void ArdourReader::placeOwnMarkers(Project& project)
+{
+    const std::vector<Node*> markers = OwnStorage::markersOf(project);
+    for (std::size_t index = 0; index < markers.size(); ++index) {
+        const auto marker = Counted<Node>::share(markers[index]);
+        auto& track = static_cast<Track&>(*marker->parent());
+        marker->remove();
+        const SessionId id = index < m_session.ownMarkers.size() ? m_session.ownMarkers[index] : 0;
+        const auto found = m_session.locations.find(id);
+        // One that was removed in Ardour is gone.
+        if (found == m_session.locations.end() || !m_ownLocations.insert(id).second)
+            continue;
+        const ArdourSession::Location& location = found->second;
+        marker->setSpan(m_session.clock.secondsOf(location.start), m_session.clock.secondsOf(location.end));
+        marker->setName(markerName(location.name, track));
+        setId(*marker, SessionKey::Location, id);
+        marker->insertInto(track);
+    }
+}
+
+} // namespace standin

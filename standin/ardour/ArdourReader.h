@@ -1,0 +1,66 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "standin/ardour/ArdourSession.h"
+#include "velmark/Counted.h"
+
+#include <pugixml.hpp>
+
+#include <filesystem>
+#include <set>
+#include <string>
+
+namespace standin {
+
+class ChangeLog;
+class MediaClip;
+class Project;
+class Track;
+
+/// Reads the text of a session. Nothing in it is trusted.
+class ArdourReader {
+public:
+    /// The oldest and the newest version that is understood.
+    static constexpr int OldestVersion = 6000;
+    static constexpr int NewestVersion = 7003;
+
+    /// Throws FileFault. `file` is where the session lies, and its sound beside it.
+    ArdourReader(std::string text, const std::filesystem::path& file);
+
+    /// Throws FileFault. Nothing of the project counts as changed.
+    Velmark::Counted<Project> read(ChangeLog& log);
+    /// What was read; to be taken once, after `read`.
+    ArdourSession takeSession() { return std::move(m_session); }
+
+private:
+    void findIds();
+    void findExtra();
+    void readClock(Project& project);
+    void readSources(Project& project);
+    void readRoutes(Project& project);
+    void readRoute(const pugi::xml_node& route, Project& project);
+    void readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track);
+    void readRegion(const pugi::xml_node& region, Track& track);
+    void readLists(SessionId route, const pugi::xml_node& node, Track& track);
+    void readList(SessionId route, const pugi::xml_node& list, Track& track, int number);
+    void dropGoneTracks(Project& project);
+    void readLocations(Project& project);
+    void placeOwnMarkers(Project& project);
+    void placeMarkersOfTheUser(Project& project);
+
+    TextRange rangeOf(const pugi::xml_node& node) const;
+    std::string optionOf(const char* name) const;
+
+    ArdourSession m_session;
+    std::filesystem::path m_file;
+    pugi::xml_document m_document;
+    pugi::xml_node m_root;
+    std::map<SessionId, Velmark::Counted<MediaClip>> m_clips; ///< by their sources
+    std::map<SessionId, pugi::xml_node> m_playlists;
+    std::set<SessionId> m_playlistsRead;
+    std::vector<SessionId> m_order;     ///< of the locations
+    std::set<SessionId> m_ownLocations; ///< which stand for markers on Cadrel's tracks
+};
+
+} // namespace standin

@@ -1,0 +1,65 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "standin/ardour/OwnStorage.h"
+
+#include "standin/ardour/ArdourSession.h"
+#include "standin/project/MediaClip.h"
+#include "standin/project/Project.h"
+#include "standin/project/Track.h"
+#include "standin/stage/ProjectWriter.h"
+
+#include <algorithm>
+
+namespace standin {
+
+namespace {
+
+bool isOfSession(const Track& track)
+{
+    return track.attributes().contains(SessionKey::Route) || track.attributes().contains(SessionKey::Markers);
+}
+
+/// Whether something of a track would be lost that the session itself doesn't hold.
+bool hasOwn(const Track& track)
+{
+    return !isOfSession(track) || track.attributes().size() > 1 || track.isLocked();
+}
+
+} // namespace
+
+std::string OwnStorage::textOf(const Project& project)
+{
+    const std::vector<Track*> tracks = project.allTracks();
+    if (project.attributes().empty() && std::ranges::none_of(tracks, [](const Track* t) { return hasOwn(*t); }))
+        return std::string();
+    // A track is asked for before what is on it.
+    const Track* around = nullptr;
+    return ProjectWriter::textOf(project, [&around](const Node& node) {
+        if (const auto* const clip = dynamic_cast<const MediaClip*>(&node))
+            return clip->kind() == MediaClip::Kind::Video;
+        if (const auto* const track = dynamic_cast<const Track*>(&node)) {
+            around = track;
+            return hasOwn(*track);
+        }
+        return !isOfSession(*around);
+    });
+}
+
+std::vector<Node*> OwnStorage::markersOf(const Project& project)
+{
+    std::vector<Node*> markers;
+    for (const Track* const track : project.allTracks()) {
+        if (!isOwnMarkerTrack(*track))
+            continue;
+        for (Node* marker = track->firstChild(); marker; marker = track->childBehind(*marker))
+            markers.push_back(marker);
+    }
+    return markers;
+}
+
+bool OwnStorage::isOwnMarkerTrack(const Track& track)
+{
+    return track.kind() == Track::Kind::Marker && !track.attributes().contains(SessionKey::Markers);
+}
+
+} // namespace standin

@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "standin/ardour/ArdourSession.h"
+
+#include <cstdint>
+#include <functional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace pugi {
+class xml_node;
+} // namespace pugi
+
+namespace standin {
+
+class ClipEvent;
+
+/// How an edge of a piece of a region came to be.
+enum class RegionEdge {
+    Old, ///< it is that of the region
+    New, ///< the region was cut there
+    Seam ///< it was cut there, and its next piece still follows
+};
+
+/// A stretch of a region at its place in the new programme, in samples.
+struct RegionPiece {
+    std::int64_t position = 0;
+    std::int64_t length = 0;
+    std::int64_t start = 0; ///< in the source
+    RegionEdge head = RegionEdge::Old;
+    RegionEdge tail = RegionEdge::Old;
+
+    bool isAll(const ArdourSession::Region& region) const
+    {
+        return position == region.position && length == region.length && start == region.start;
+    }
+};
+
+/// The pieces that play something, in the order of the events. All samples of an event are moved by the same number of
+/// samples, the nearest to how far the event has moved.
+std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std::vector<const ClipEvent*>& events,
+                                  const SessionClock& clock);
+
+/// Gives the lists in the element of a region other ids.
+void giveNewIds(pugi::xml_node& element, const std::function<SessionId()>& newId);
+
+/// Makes the element of a region that of a piece: place, length, fades, gain envelope, sync point. New lists in it get their
+/// ids from `newId`. At a new edge it fades over `edgeFade` samples; 0 is no fade.
+void cutRegion(pugi::xml_node& element, const ArdourSession::Region& region, const RegionPiece& piece,
+               const SessionClock& clock, std::int64_t edgeFade, const std::function<SessionId()>& newId);
+
+} // namespace standin

@@ -1,0 +1,49 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <map>
+#include <string>
+#include <tuple>
+#include <vector>
+
+namespace cadrel::tests {
+
+/// What Ardour itself says of a session.
+struct ArdourDump {
+    struct Region {
+        std::string track;
+        std::string name;
+        std::int64_t position;
+        std::int64_t length;
+        std::int64_t start;
+
+        auto operator<=>(const Region&) const = default;
+    };
+    using Location = std::tuple<std::string, std::int64_t, std::int64_t>; ///< name, start, end
+
+    std::vector<Region> regions;
+    std::vector<Location> locations;
+    std::map<std::tuple<std::string, std::string, std::int64_t>, double> values; ///< by track, list and sample
+    std::vector<std::string> complaints;                                         ///< warnings and errors of the load
+};
+
+/// The programs of Ardour, run without a display. Each call throws std::runtime_error with what the program said when it
+/// fails.
+class ArdourProgram {
+public:
+    static bool isInstalled();
+
+    /// `name` is without extension, for all calls.
+    static void make(const std::filesystem::path& folder, const std::string& name, int tracks);
+    /// `points` is a list of "what:sample:value", for all tracks. The session is saved by Ardour.
+    static void automate(const std::filesystem::path& folder, const std::string& name, const std::string& points);
+    static ArdourDump dump(const std::filesystem::path& folder, const std::string& name,
+                           const std::vector<std::int64_t>& samples);
+    /// The left channel of the mix over the session range.
+    static std::vector<float> mix(const std::filesystem::path& folder, const std::string& name);
+};
+
+} // namespace cadrel::tests
