@@ -6,6 +6,7 @@
 #   make test           every test; PRESET=asan runs them under the sanitizers
 #   make build          the programs into build/release/bin, the libraries into build/release/lib
 #   make bench          the benchmarks, and the whole program against its bounds
+#   make videos         renders the old and the new cut of the example reel, into examples/reel3/Video
 #   make docs-pictures  the pictures of change notes and of the window in docs/pictures
 #   make fuzz           every fuzzer for FUZZ_SECONDS from its corpus
 #   make pictures       draws the pictures of the window anew that the tests compare with; look at each before you keep it
@@ -18,7 +19,7 @@ sources = $(shell find src standin app examples tests bench fuzz -name '*.cpp' -
 reel3 = examples/reel3
 picture_tests = cadrel_gui_window_tests
 
-.PHONY: run test build bench fuzz pictures docs-pictures format check-format clean
+.PHONY: run test build bench videos fuzz pictures docs-pictures format check-format clean
 
 run:
 	@cmake/build.sh release cadrel
@@ -45,6 +46,13 @@ bench:
 	build/release/bin/cadrel_bench
 	build/release/bin/cadrel_bench_host
 	build/release/bin/cadrel_bench_program build/release/bin/cadrel build/bench
+
+videos:
+	@cmake/build.sh release render_reel3
+	@cmake/install-packages.sh videos
+	@mkdir -p $(reel3)/Video
+	build/release/bin/render_reel3 $(reel3)/reel3_v07.edl $(reel3)/Video/LW_R3_v07.mov
+	build/release/bin/render_reel3 $(reel3)/reel3_v12.edl $(reel3)/Video/LW_R3_v12.mov
 
 docs-pictures:
 	@cmake/build.sh release cadrel make_cuts cadrel_module_tests

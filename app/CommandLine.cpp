@@ -111,7 +111,8 @@ only the JSON goes to standard output, with all points and with times in seconds
 Examples:
   cadrel show reel3.stage
   cadrel show reel3.stage --track "DIA 1"
-  cadrel show reel3.stage --track Music --json -)";
+  cadrel show reel3.stage --track Music --json -
+  cadrel show reel3.stage --media)";
 
 /// In the order of ApplyOptions::Keep.
 constexpr std::array<const char*, 2> KeepWords{"all", "cut"};
@@ -451,11 +452,16 @@ CLI::App* addShow(CLI::App& program, ShowOptions& options)
 {
     CLI::App* const show = program.add_subcommand("show", "Show what is in a sound project");
     show->add_option("PROJECT", options.projectFile, "The project to show")->type_name("")->required();
-    show->add_option("--track", options.trackName,
-                     "Show only the tracks of that name; a folder stands for all that is in it")
-        ->check(isNamed)
-        ->type_name("NAME");
+    CLI::Option* const track =
+        show->add_option("--track", options.trackName,
+                         "Show only the tracks of that name; a folder stands for all that is in it")
+            ->check(isNamed)
+            ->type_name("NAME");
     addJson(*show, options.jsonFile, options.isReplacing, AllJsonHelp);
+    show->add_flag("--media", options.isMedia,
+                   "Show the files of the media pool instead: rate, length, what is missing")
+        ->excludes(track)
+        ->excludes("--json");
     show->footer(ShowHelp);
     return show;
 }

@@ -51,9 +51,10 @@ std::u16string fullPathOf(const fs::path& file)
 } // namespace
 
 struct Application::Services {
-    explicit Services(const Terminal& ofUser) : terminal(ofUser) {}
+    Services(const Terminal& ofUser, VideoSupport* ofVideos) : terminal(ofUser), videos(ofVideos) {}
 
     Terminal terminal;
+    VideoSupport* videos;
     Counted<AlertService> alerts = makeCounted<AlertService>(terminal);
     Counted<DependencyManager> dependencies = makeCounted<DependencyManager>();
     Counted<FileSelector> fileSelector = makeCounted<FileSelector>();
@@ -70,7 +71,8 @@ struct Application::Services {
     Counted<HostContext> context = makeCounted<HostContext>();
 };
 
-Application::Application(const Terminal& terminal) : m_services(std::make_unique<Services>(terminal))
+Application::Application(const Terminal& terminal, VideoSupport* videos)
+    : m_services(std::make_unique<Services>(terminal, videos))
 {
     HostContext& context = *m_services->context;
     context.offer<IActionManager>(actions());
@@ -81,7 +83,7 @@ Application::Application(const Terminal& terminal) : m_services(std::make_unique
     context.offer<IHostInfo>(*makeCounted<HostInfo>());
     context.offer<IIdleManager>(idleManager());
     context.offer<IMenuRegistry>(menus());
-    context.offer<IObjectFactory>(*makeCounted<ObjectFactory>());
+    context.offer<IObjectFactory>(*makeCounted<ObjectFactory>(videos));
     context.offer<IProgressService>(progress());
     context.offer<IProjectManager>(projects());
     context.offer<ITranslationService>(translations());
@@ -104,14 +106,20 @@ IHostContext* Application::context()
 
 Project& Application::createProject()
 {
-    return projects().add(makeCounted<Project>(edits().log()));
+    return add(makeCounted<Project>(edits().log()));
 }
 
 Project& Application::openProject(const fs::path& file)
 {
     const auto project = ProjectFile::read(file, edits().log());
     project->setPath(fullPathOf(file));
-    return projects().add(project);
+    return add(project);
+}
+
+Project& Application::add(Counted<Project> project)
+{
+    project->pool().setVideoSupport(m_services->videos);
+    return projects().add(std::move(project));
 }
 
 void Application::saveProject(Project& project, const fs::path& file,

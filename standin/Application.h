@@ -26,6 +26,7 @@ class Project;
 class ProjectManager;
 class Translations;
 class Transport;
+class VideoSupport;
 class ViewManager;
 class WindowFactoryRegistry;
 
@@ -35,8 +36,9 @@ class WindowFactoryRegistry;
 /// It belongs to one thread. What a module has registered has to be taken back before the application goes.
 class Application {
 public:
-    /// `terminal` is where the user is; by default there is none.
-    explicit Application(const Terminal& terminal = Terminal());
+    /// `terminal` is where the user is; by default there is none. With `videos`, which have to outlive the application, the
+    /// pictures of the videos are their own, and new videos can come into the pools.
+    explicit Application(const Terminal& terminal = Terminal(), VideoSupport* videos = nullptr);
     Application(const Application&) = delete;
     Application& operator=(const Application&) = delete;
     /// Closes all projects.
@@ -79,6 +81,8 @@ public:
 
 private:
     struct Services;
+
+    Project& add(Velmark::Counted<Project> project);
 
     std::unique_ptr<Services> m_services;
 };

@@ -2,6 +2,7 @@
 
 #include "standin/ObjectFactory.h"
 
+#include "standin/project/VideoSupport.h"
 #include "standin/services/ThumbnailFactory.h"
 
 #include <string_view>
@@ -15,7 +16,8 @@ FUnknown* ObjectFactory::createObject(const char* className, const char* typeNam
     if (!className || !typeName || std::string_view(className) != ThumbnailClass ||
         std::string_view(typeName) != ThumbnailType)
         return nullptr;
-    FObject* const created = makeCounted<ThumbnailFactory>().detach();
+    FObject* const created =
+        m_videos ? m_videos->createThumbnailFactory().detach() : makeCounted<ThumbnailFactory>().detach();
     m_givenOut.insert(created);
     return created;
 }

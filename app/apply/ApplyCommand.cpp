@@ -24,9 +24,9 @@
 #include "core/cut/ProgrammeShift.h"
 #include "core/edl/EventBase.h"
 #include "core/keep/ChangeStretch.h"
-#include "core/keep/Material.h"
 #include "core/keep/PastRuns.h"
 #include "core/model/DataModel.h"
+#include "core/protect/RunRecord.h"
 #include "core/time/SecondsRange.h"
 #include "core/time/Timecode.h"
 #include "standin/base/Times.h"
@@ -319,54 +319,6 @@ FrameRanges sourcesOf(const DataModel& model, const KeptRun* kept)
     return sources;
 }
 
-/// The frames of the new programme that a run with these settings may change.
-core::FrameRange allowedFrames(const Settings& settings)
-{
-    // A stored range that makes no sense is the next run's to refuse, if it still has it then.
-    if (!settings.restrictRange() || !(settings.preserveMaterialBefore() <= settings.preserveMaterialAfter()))
-        return core::PastRuns::AllTime;
-    const FrameRanges frames = core::framesOfMaterial(
-        {{settings.preserveMaterialBefore(), settings.preserveMaterialAfter()}}, Timecode::framerate());
-    return frames.empty() ? core::FrameRange() : frames.front();
-}
-
-/// The runs that the project has behind it; the lists of the model tell of the last, which could change `allowed`.
-core::PastRuns pastRunsOf(const DataModel& model, const core::FrameRange& allowed)
-{
-    const Settings& settings = model.settings();
-    core::PastRuns runs({settings.matchBy(), settings.vfxPatterns(), Timecode::framerate()});
-    core::Variant stored;
-    if (model.getProperty(core::PropertyKey::EarlierRuns, stored) == util::Result::Ok)
-        runs.read(stored.toText());
-    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl(), allowed);
-    return runs;
-}
-
-/// Where the run of the model's change list finds or leaves sound: what it may change, and where that comes from.
-FrameRanges readFrames(const DataModel& model)
-{
-    const core::FrameRange allowed = allowedFrames(model.settings());
-    FrameRanges frames{allowed};
-    if (allowed == core::PastRuns::AllTime)
-        return frames;
-    for (const auto& event : model.changeEdl().events()) {
-        const auto stretch = core::changeStretchOf(*event, Timecode::framerate());
-        if (stretch)
-            frames.push_back(intersect(stretch->destination, allowed).shiftedBy(-stretch->shift));
-    }
-    return core::united(std::move(frames));
-}
-
-/// Lets the project keep of the runs behind it what that of the model's lists leaves.
-void remember(core::PastRuns& runs, DataModel& model)
-{
-    runs.forgetHiddenBy(model.oldEdl(), model.newEdl(), model.changeEdl(), allowedFrames(model.settings()));
-    if (runs.isEmpty())
-        model.removeProperty(core::PropertyKey::EarlierRuns);
-    else
-        model.setProperty(core::PropertyKey::EarlierRuns, core::Variant(runs.toBytes()));
-}
-
 /// Adds what isn't stored with the project.
 void addChoices(SettingsReport& settings, const ApplyOptions& options)
 {
@@ -387,7 +339,7 @@ public:
         : m_hosted(hosted), m_clock(clock), m_options(options), m_edls(edlsOf(options)), m_facts(hosted.model())
     {
         DataModel& model = hosted.model();
-        core::PastRuns runs = pastRunsOf(model, lastAllowed);
+        const core::PastRuns runs = core::RunRecord::findOrGuess(model, lastAllowed);
         const ChangeSource source = fillChangeList(model, options, terminal);
         m_facts.projectName = fileNameOf(options.projectFile);
         if (const standin::ProjectForm* const form = hosted.project().form())
@@ -403,10 +355,11 @@ public:
         m_facts.jsonFile = Output::isFile(options.jsonFile) ? options.jsonFile : std::string();
         m_facts.notesFile = options.notesFile;
         const Plausibility plausibility(model, options.projectFile, m_edls);
+        const core::NextRun next(model, sourceOf(source));
         if (source.cuts)
-            checkCuts(plausibility, runs, terminal);
-        require(plausibility.doubtOfChanges(runs, !source.cuts, allowedFrames(model.settings())), options, terminal);
-        remember(runs, model);
+            checkCuts(plausibility, next, runs, terminal);
+        require(plausibility.doubtOfChanges(next, runs), options, terminal);
+        core::RunRecord::write(runs, model);
         plan(source.cuts.has_value(), terminal);
         if (source.cuts) {
             require(plausibility.doubtOfSurvival(sourcesOf(model, m_kept ? &*m_kept : nullptr)), options, terminal);
@@ -421,9 +374,15 @@ public:
 private:
     bool isPlanned(const ChangeSource& source) const { return m_kept && source.cuts; }
 
-    void checkCuts(const Plausibility& plausibility, const core::PastRuns& runs, Terminal& terminal)
+    static KeptRun::Source sourceOf(const ChangeSource& source)
     {
-        require(plausibility.doubtOfLastCut(runs, readFrames(m_hosted.model())), m_options, terminal);
+        return source.cuts ? KeptRun::Source::Generated : KeptRun::Source::Given;
+    }
+
+    void checkCuts(const Plausibility& plausibility, const core::NextRun& next, const core::PastRuns& runs,
+                   Terminal& terminal)
+    {
+        require(plausibility.doubtOfLastCut(next, runs), m_options, terminal);
         require(plausibility.doubtOfNames(), m_options, terminal);
         require(plausibility.doubtOfSound(m_hosted.project()), m_options, terminal);
         if (const auto dull = plausibility.dullNames()) {
@@ -613,7 +572,7 @@ void runApply(const ApplyOptions& options, Terminal& terminal)
     hosted.endPreview();
     if (options.isFresh)
         forgetStored(hosted.model());
-    const core::FrameRange lastAllowed = allowedFrames(hosted.model().settings());
+    const core::FrameRange lastAllowed = core::RunRecord::allowedBy(hosted.model().settings());
     configure(hosted.model().settings(), options.generation.settings);
     restrictRange(hosted.model().settings(), options.generation.settings.preserve);
     Preparation run(hosted, clock, options, lastAllowed, terminal);

@@ -45,7 +45,7 @@ std::string inWords(const Fate& fate, const ProjectClock& clock)
 {
     std::vector<std::string> words;
     if (fate.isLost())
-        words.emplace_back("in no cut");
+        words.emplace_back("fell out");
     if (fate.isMoved)
         words.emplace_back("moved");
     std::string trimmed;
@@ -244,7 +244,7 @@ void ApplyListing::printTrackTotals(std::ostream& out) const
                             cell(count.moved),    cell(count.trimmed), cell(count.split),
                             cell(count.doubled),  cell(count.lost),    cell(count.added)};
     };
-    Columns columns({"track", "holds", "stay", "moved", "trimmed", "split", "doubled", "in no cut", "new"},
+    Columns columns({"track", "holds", "stay", "moved", "trimmed", "split", "doubled", "fell out", "new"},
                     {1, 2, 3, 4, 5, 6, 7, 8});
     for (const TrackComparison* const track : m_facts.userTracks())
         columns.measure(rowOf(*track));

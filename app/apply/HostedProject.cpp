@@ -147,9 +147,19 @@ void HostedProject::endPreview()
 
 void HostedProject::apply()
 {
+    apply([this] { return m_host->startCadrel(); });
+}
+
+void HostedProject::applyWithin(const core::SecondsRange& bounds)
+{
+    apply([&] { return m_host->startCadrelWithin(bounds); });
+}
+
+void HostedProject::apply(const std::function<Result::Type()>& request)
+{
     // What a run that breaks off leaves would be further off.
     const std::optional<std::string> far = farContent(*m_project, clockOf(*m_project, m_file));
-    const Result::Type result = m_host->startCadrel();
+    const Result::Type result = request();
     if (result != Result::Ok)
         throw startFailure(result, m_file);
     const RunEnd end(*m_host);

@@ -4,13 +4,16 @@
 
 #include "standin/Application.h"
 #include "util/FileStamp.h"
+#include "util/Result.h"
 #include "velmark/Counted.h"
 
+#include <functional>
 #include <optional>
 #include <string>
 
 namespace cadrel::core {
 class DataModel;
+struct SecondsRange;
 } // namespace cadrel::core
 
 namespace cadrel::host {
@@ -46,6 +49,8 @@ public:
     /// Applies the change list of the model. An Interruption cancels it, and what has been done is taken back. Throws
     /// Interruption::Requested then, and Failure when the run couldn't begin or failed.
     void apply();
+    /// The same, but nothing changes outside of the bounds, in seconds of the project's clock.
+    void applyWithin(const core::SecondsRange& bounds);
 
     /// Throws Failure where the project can't be written, as far as that is known before a run.
     void requireTarget(const std::string& file) const;
@@ -61,6 +66,7 @@ public:
 
 private:
     void dropUnreadableModel(Opening opening);
+    void apply(const std::function<util::Result::Type()>& request);
     void save(const std::string& file, const std::optional<util::FileStamp>& expected);
 
     std::string m_file;

@@ -9,7 +9,7 @@
 #include "app/edl/ProjectClock.h"
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
-#include "core/protect/RestrictedRange.h"
+#include "core/protect/RunRecord.h"
 #include "core/settings/Settings.h"
 #include "core/time/Timecode.h"
 #include "standin/project/Project.h"
@@ -135,12 +135,13 @@ KeptRun::KeptRun(DataModel& model, const standin::Project& project, const Projec
 
 void KeptRun::apply(HostedProject& hosted) const
 {
-    if (!needsRun())
-        return;
     DataModel& model = hosted.model();
-    const core::RestrictedRange restricted(model.settings(), bounds());
+    if (!needsRun()) {
+        core::RunRecord::addRun(model, core::RunRecord::allowedBy(model.settings()));
+        return;
+    }
     const NothingCarried nothing(model.changeEdl());
-    hosted.apply();
+    hosted.applyWithin(bounds());
 }
 
 const char* wordOf(core::CarriedFrom from)

@@ -8,10 +8,10 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/ProgrammePlace.h"
 #include "core/keep/Material.h"
-#include "core/keep/PastRuns.h"
 #include "core/model/DataModel.h"
 #include "core/picture/PictureLine.h"
 #include "core/picture/PictureNames.h"
+#include "core/protect/RunRecord.h"
 #include "core/settings/MatchBy.h"
 #include "core/settings/VfxNameMatcher.h"
 #include "core/time/Timecode.h"
@@ -27,10 +27,10 @@ using core::DataModel;
 using core::EventBase;
 using core::EventFlaw;
 using core::EventList;
-using core::FrameRange;
 using core::FrameRanges;
 using core::Framerate;
 using core::MatchBy;
+using core::NextRun;
 using core::PastRuns;
 using core::PictureLine;
 using core::PictureNames;
@@ -93,14 +93,9 @@ Plausibility::Plausibility(const DataModel& model, const std::string& projectFil
 {
 }
 
-std::optional<Failure> Plausibility::doubtOfLastCut(const PastRuns& runs, const FrameRanges& asked) const
+std::optional<Failure> Plausibility::doubtOfLastCut(const NextRun& next, const PastRuns& runs) const
 {
-    // A project doesn't store which shots are reversed.
-    EventList oldCut;
-    oldCut.copyFrom(m_model.oldEdl());
-    for (const auto& event : oldCut.events())
-        event->setReversed(false);
-    const std::optional<std::int32_t> difference = runs.firstDifference(oldCut, asked);
+    const std::optional<std::int32_t> difference = next.firstDifference(runs);
     if (!difference)
         return std::nullopt;
     return Failure{m_projectFile,
@@ -109,9 +104,9 @@ std::optional<Failure> Plausibility::doubtOfLastCut(const PastRuns& runs, const 
                    "give that cut with --old, take the project as it was before, or give --force"};
 }
 
-std::optional<Failure> Plausibility::doubtOfChanges(const PastRuns& runs, bool isGiven, const FrameRange& allowed) const
+std::optional<Failure> Plausibility::doubtOfChanges(const NextRun& next, const PastRuns& runs) const
 {
-    if (!runs.haveCarriedOut(m_model.changeEdl(), isGiven, allowed))
+    if (!next.hasBeenDone(runs))
         return std::nullopt;
     return Failure{m_inputs, "this change has been carried out in the project already",
                    "take the project as it was before, or give --force"};

@@ -11,6 +11,7 @@
 
 namespace cadrel::core {
 class DataModel;
+class NextRun;
 class PastRuns;
 } // namespace cadrel::core
 
@@ -27,13 +28,10 @@ public:
     /// The model holds both cuts; all outlive this. `inputs` names the EDLs.
     Plausibility(const core::DataModel& model, const std::string& projectFile, const std::string& inputs);
 
-    /// Whether the sound stands in another cut than the old one given, as far as both have a reel at the same time in
-    /// `asked`.
-    std::optional<Failure> doubtOfLastCut(const core::PastRuns& runs, const core::FrameRanges& asked) const;
-    /// Whether the change EDL of the model has been carried out already in some of `allowed`; `isGiven` for one that isn't
-    /// made of two cuts.
-    std::optional<Failure> doubtOfChanges(const core::PastRuns& runs, bool isGiven,
-                                          const core::FrameRange& allowed) const;
+    /// Whether the sound stands in another cut than the old one given.
+    std::optional<Failure> doubtOfLastCut(const core::NextRun& next, const core::PastRuns& runs) const;
+    /// Whether the change EDL has been carried out already.
+    std::optional<Failure> doubtOfChanges(const core::NextRun& next, const core::PastRuns& runs) const;
     /// Whether the two cuts have no name in common.
     std::optional<Failure> doubtOfNames() const;
     /// Whether less than half of the old cut has any sound.

@@ -5,6 +5,7 @@
 #include "util/PrintableCharacter.h"
 #include "util/Utf8Text.h"
 
+#include <algorithm>
 #include <clocale>
 #include <cwchar>
 #include <locale.h> // NOLINT(modernize-deprecated-headers): the locales of POSIX
@@ -53,10 +54,17 @@ Shown firstShown(std::string_view text)
     return {character.bytes == 0 ? 1 : character.bytes, "?", 1};
 }
 
+bool isPlain(std::string_view text)
+{
+    return std::all_of(text.begin(), text.end(), [](char letter) { return letter >= ' ' && letter <= '~'; });
+}
+
 } // namespace
 
 PrintableText toPrintable(std::string_view text, std::size_t mostColumns)
 {
+    if (text.size() <= mostColumns && isPlain(text))
+        return {std::string(text), text.size()};
     PrintableText result;
     // Of the longest beginning that leaves a column for the "…".
     std::size_t cutSize = 0;

@@ -57,6 +57,7 @@ public:
     {
         const NoteStep& step = *entry.step();
         const bool isMove = step.action == StepAction::Move;
+        const bool movesReel = step.action == StepAction::MoveReel;
         const PictureChange& largest = NotesWording::largestChange(entry);
         const core::EventBase* const shot = largest.newShot != nullptr ? largest.newShot : largest.oldShot;
         const auto time = [this](std::int32_t frames) { return frames == 0 ? "" : m_words.plainTimecode(frames); };
@@ -66,8 +67,10 @@ public:
             std::to_string(entry.number),
             std::to_string(reel + 1),
             std::string(wordOf(step.action)),
-            m_words.plainTimecode(notes.timecodeOf(step.place)),
-            isMove ? m_words.plainTimecode(notes.timecodeOf(step.from)) : "",
+            m_words.plainTimecode(notes.timecodeOf(step.place, reel)),
+            isMove      ? m_words.plainTimecode(notes.timecodeOf(step.from, reel))
+            : movesReel ? m_words.plainTimecode(notes.oldTimecode(largest.inOld->start))
+                        : "",
             time(step.removed),
             time(step.inserted.length),
             time(step.moved),
@@ -83,9 +86,9 @@ public:
             largest.inNew ? m_words.plainTimecode(notes.newTimecode(largest.inNew->start)) : "",
             asText(changesOf(step)),
             NotesWording::feet(step.place.frame),
-            isMove ? NotesWording::feet(step.from.frame) : "",
+            isMove || movesReel ? NotesWording::feet(step.from.frame) : "",
             std::to_string(step.place.reel + 1),
-            isMove ? std::to_string(step.from.reel + 1) : "",
+            isMove || movesReel ? std::to_string(step.from.reel + 1) : "",
             m_document.rate,
             source ? source->toString() : ""};
         std::string row;
@@ -115,7 +118,7 @@ private:
             tracks += (tracks.empty() ? "" : ", ") + toPrintable(m_document.sound->tracks.at(track).name).text;
         std::string lines;
         for (const SoundLine& line : words.lines(sound))
-            lines += concatenated({lines.empty() ? "" : "; ", line.name, " at ", line.time, ": ", line.what});
+            lines += concatenated({lines.empty() ? "" : "; ", line.name, " at ", line.time, ": ", line.whatAndMore()});
         if (const std::string rest = SoundWording::rest(sound); !rest.empty())
             lines.append("; ").append(rest);
         const std::array<std::string, 10> cells{

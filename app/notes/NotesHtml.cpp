@@ -68,6 +68,8 @@ KindLabel labelOf(ChangeKind kind)
         return {"version", "version"};
     case ChangeKind::Unchanged:
         return {"trimmed", "unchanged"};
+    case ChangeKind::ReelMoved:
+        return {"moved", "reel"};
     case ChangeKind::TransitionAdded:
     case ChangeKind::TransitionRemoved:
     case ChangeKind::TransitionChanged:
@@ -109,6 +111,12 @@ std::string escaped(const std::string& text)
         }
     }
     return html;
+}
+
+/// A name, whose letters may run from right to left, apart from what stands before and after it.
+std::string nameInHtml(const std::string& name)
+{
+    return concatenated({"<bdi>", escaped(name), "</bdi>"});
 }
 
 /// Whether every one of the frames belongs to a change.
@@ -174,17 +182,30 @@ private:
             return concatenated({"<li><b>", escaped(value), "</b><span>", what, "</span></li>"});
         };
         const auto time = [this](std::int32_t frames) { return m_words.timecode(frames); };
-        m_sink("<h1>Change notes</h1>\n<p class=\"dim\">Old cut: " + escaped(m_words.cutText(false)) +
-               "<br>New cut: " + escaped(m_words.cutText(true)) + "<br>" + escaped(m_document.rate) +
-               "</p>\n<ul class=\"numbers\">" + number(std::to_string(totals.steps), "steps") +
-               number(time(totals.before), "before") + number(time(totals.after), "after") +
+        m_sink("<h1>Change notes</h1>\n");
+        if (!m_words.titles().empty())
+            m_sink(concatenated({"<p class=\"titles\">", nameInHtml(m_words.cutTitle(false)), " to ",
+                                 nameInHtml(m_words.cutTitle(true)), "</p>\n"}));
+        m_sink("<p class=\"dim\">Old cut: " + cutInHtml(false) + "<br>New cut: " + cutInHtml(true) + "<br>" +
+               escaped(m_document.rate) + "</p>\n<ul class=\"numbers\">" +
+               number(std::to_string(totals.steps), "steps") + number(time(totals.before), "before") +
+               number(time(totals.after), "after") +
                number(m_words.change(totals.after - totals.before), "change of length") +
                number(time(totals.lifted), "lifted") + number(time(totals.inserted), "inserted") +
                number(time(totals.moved), "moved") + number(time(totals.doubled), "doubled") + "</ul>\n");
         if (m_document.sound != nullptr)
             writeLines("Sound: ", SoundWording(*m_document.sound).totals());
         writeLines("", m_words.settings());
-        m_sink(concatenated({"<p>", escaped(m_words.order()), "</p>\n"}));
+        if (const std::string order = m_words.order(); !order.empty())
+            m_sink(concatenated({"<p>", escaped(order), "</p>\n"}));
+    }
+
+    /// What is told of a cut, which begins with its name.
+    std::string cutInHtml(bool isNew) const
+    {
+        const std::string name = m_words.cutName(isNew);
+        const std::string text = m_words.cutText(isNew);
+        return text.starts_with(name) ? nameInHtml(name) + escaped(text.substr(name.size())) : escaped(text);
     }
 
     void writeLines(const std::string& title, const std::vector<std::string>& lines)
@@ -270,9 +291,10 @@ private:
             }
             if (entry.step() == nullptr)
                 continue;
-            if (entry.step()->action == core::StepAction::Move)
+            const core::StepAction action = entry.step()->action;
+            if (action == core::StepAction::Move)
                 m_moves[rangeOf(entry).start] = &entry;
-            else if (movesAlone)
+            else if (movesAlone && action != core::StepAction::MoveReel)
                 drawStep(entry);
         }
     }
@@ -407,7 +429,7 @@ private:
         for (const NoteEntry* const entry : steps) {
             m_sink(
                 concatenated({"<li><a href=\"#", idOf(*entry), "\">step ", std::to_string(entry->number), "</a>: "}) +
-                escaped(m_words.action(*entry)) + ", " + escaped(m_words.shotsOf(*entry)) + soundSummary(*entry) +
+                escaped(m_words.action(*entry)) + ", " + nameInHtml(m_words.shotsOf(*entry)) + soundSummary(*entry) +
                 "</li>\n");
         }
         m_sink("</ol>\n");
@@ -460,12 +482,11 @@ private:
             return concatenated({"<td class=\"", kind, "\">", html, "</td>"});
         };
         std::string feet;
-        if (m_document.layout.showsFeet && isStep)
-            feet = "<p class=\"change\"><small>" + escaped(m_words.inFeet(entry)) + "</small></p>";
+        if (const std::string words = m_words.inFeet(entry); m_document.layout.showsFeet && !words.empty())
+            feet = "<p class=\"change\"><small>" + words + "</small></p>";
         return "<tr id=\"" + id + "\" tabindex=\"0\"" + (isStep ? "" : " class=\"k\"") + " data-kinds=\"" +
                filtersOf(entry) + "\">" + cell("num", isStep ? std::to_string(entry.number) : "") +
-               cell("tc", m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel)))) +
-               cell("tc", escaped(m_words.action(entry))) +
+               cell("tc", m_words.timeOf(entry, reel)) + cell("tc", escaped(m_words.action(entry))) +
                cell("", isStep ? changesOf(*entry.step()) + feet + soundOf(entry) : moveOf(entry)) +
                cell("tc num", entry.lengthChange == 0 ? "" : m_words.change(entry.lengthChange)) +
                cell("tc num", m_words.offsetInColumn(entry, reel)) + "</tr>\n";
@@ -488,7 +509,7 @@ private:
         if (end == nullptr)
             return {};
         return concatenated(
-            {"<a href=\"#s", std::to_string(end->step), "\">", escaped(m_words.describe(end->move).shot), "</a>"});
+            {"<a href=\"#s", std::to_string(end->step), "\">", nameInHtml(m_words.describe(end->move).shot), "</a>"});
     }
 
     /// The label stands before it already.
@@ -505,12 +526,12 @@ private:
             const auto [filter, label] = labelOf(change.kind);
             html += concatenated({"<p class=\"change\"><span class=\"tag ",
                                   change.kind == ChangeKind::Unchanged ? "kept" : filter, "\">", label, "</span>",
-                                  escaped(words.shot), " <small>", escaped(withoutLabel(words.what, label))}) +
+                                  nameInHtml(words.shot), " <small>", escaped(withoutLabel(words.what, label))}) +
                     (words.more.empty() ? "" : ", " + escaped(words.more)) + "</small></p>";
         }
         if (step.joined > 1)
             html += "<p class=\"change\"><small>joined from " + std::to_string(step.joined) +
-                    " trims that cancel out</small></p>";
+                    " steps whose trims cancel out</small></p>";
         return html;
     }
 
@@ -529,7 +550,7 @@ private:
             return {};
         std::string html;
         if (!sound->scenes.empty())
-            html += "<p class=\"change\"><small>scene: " + escaped(SoundWording::scenes(*sound)) + "</small></p>";
+            html += "<p class=\"change\"><small>scene: " + nameInHtml(SoundWording::scenes(*sound)) + "</small></p>";
         return sound->isEmpty() ? html : html + soundDetails(*sound);
     }
 
@@ -544,8 +565,8 @@ private:
         std::string html = "<details class=\"sound\"><summary><span class=\"tag sound\">sound</span>" +
                            escaped(words.summary(sound)) + "</summary><ul>";
         for (const SoundLine& line : lines)
-            html += "<li><span class=\"tc\">" + escaped(line.time) + "</span> " + escaped(line.name) + " <small>" +
-                    escaped(line.what) + "</small></li>";
+            html += "<li><span class=\"tc\">" + escaped(line.time) + "</span> " + nameInHtml(line.name) + " <small>" +
+                    escaped(line.whatAndMore()) + "</small></li>";
         if (const std::string rest = SoundWording::rest(sound); !rest.empty())
             html += "<li>" + rest + "</li>";
         return html + "</ul></details>";

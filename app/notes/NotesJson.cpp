@@ -177,6 +177,7 @@ private:
             doubts.push_back(std::move(doubt));
         }
         return {{"files", isNew ? m_document.cuts.newNames : m_document.cuts.oldNames},
+                {"titles", isNew ? m_document.cuts.newTitles : m_document.cuts.oldTitles},
                 {"events", events.size()},
                 {"invalid", events.countInvalid()},
                 {"unread", toJson(isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread)},
@@ -241,7 +242,7 @@ private:
         const core::MoveEnd& end = *entry.moveEnd();
         return {{"row", "moved"},
                 {"step", end.step},
-                {"at", placeJson(end.place)},
+                {"at", placeJson(end.place, end.place.reel)},
                 {end.isTarget ? "fromReel" : "toReel", end.otherReel + 1},
                 {"frames", end.move.frames},
                 {"offsetFrames", entry.runningOffset}};
@@ -258,11 +259,16 @@ private:
                  m_document.notes.newTimecode(kept.newStart) - m_document.notes.oldTimecode(kept.oldStart)}};
     }
 
-    ordered_json placeJson(const core::WorkPlace& place) const
+    /// In a row of a reel.
+    ordered_json placeJson(const core::WorkPlace& place, std::size_t reel) const
     {
-        ordered_json json{{"reel", place.reel + 1},
-                          {"timecode", m_words.plainTimecode(m_document.notes.timecodeOf(place))},
-                          {"frame", place.frame}};
+        return placeAt(place, m_document.notes.timecodeOf(place, reel));
+    }
+
+    ordered_json placeAt(const core::WorkPlace& place, std::int32_t timecode) const
+    {
+        ordered_json json{
+            {"reel", place.reel + 1}, {"timecode", m_words.plainTimecode(timecode)}, {"frame", place.frame}};
         if (m_document.layout.showsFeet)
             json["feet"] = NotesWording::feet(place.frame);
         return json;
@@ -274,15 +280,17 @@ private:
         ordered_json json{{"row", "step"},
                           {"number", entry.number},
                           {"action", wordOf(step.action)},
-                          {"at", placeJson(step.place)},
+                          {"at", placeJson(step.place, step.reel())},
                           {"deleteFrames", step.removed},
                           {"insertFrames", step.inserted.length}};
         if (step.inserted.length > 0)
             json["insertFrom"] = m_words.plainTimecode(m_document.notes.newTimecode(step.inserted.start));
         if (step.action == core::StepAction::Move) {
-            json["from"] = placeJson(step.from);
+            json["from"] = placeJson(step.from, step.reel());
             json["moveFrames"] = step.moved;
         }
+        if (step.action == core::StepAction::MoveReel)
+            json["from"] = placeAt(step.from, m_document.notes.oldTimecode(step.changes.front().inOld->start));
         json["lengthChangeFrames"] = entry.lengthChange;
         json["offsetFrames"] = entry.runningOffset;
         json["joinedSteps"] = step.joined;
@@ -291,7 +299,7 @@ private:
         for (const PictureChange& change : step.changes) {
             changes.push_back(changeJson(change));
             if (change.kind == core::ChangeKind::Doubled && doubled < step.doubledFrom.size())
-                changes.back()["standsAt"] = placeJson(step.doubledFrom[doubled++]);
+                changes.back()["standsAt"] = placeJson(step.doubledFrom[doubled++], step.reel());
         }
         json["changes"] = std::move(changes);
         return json;
@@ -316,6 +324,10 @@ private:
             json["shots"] = change.shots;
         if (change.isPart)
             json["part"] = true;
+        if (change.hasOldTransition)
+            json["oldTransition"] = true;
+        if (change.hasNewTransition)
+            json["newTransition"] = true;
         return json;
     }
 

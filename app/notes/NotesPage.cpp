@@ -16,7 +16,7 @@ const std::string_view NotesPage::Style = R"(
 body { margin: 0; padding: 28px; background: var(--paper); color: var(--ink); font: 15px/1.45 system-ui, sans-serif; }
 main { max-width: 1180px; margin: 0 auto; }
 h1 { font-size: 25px; margin: 0 0 2px; } h2 { font-size: 18px; margin: 34px 0 2px; }
-p { margin: 0 0 12px; overflow-wrap: anywhere; } .dim { color: var(--dim); }
+p { margin: 0 0 12px; overflow-wrap: anywhere; } .dim { color: var(--dim); } .titles { font-size: 17px; font-weight: 500; margin: 0 0 4px; }
 .numbers { display: flex; flex-wrap: wrap; gap: 10px; margin: 16px 0 22px; padding: 0; list-style: none; }
 .numbers li { background: var(--card); border: 1px solid var(--line); border-radius: 6px; padding: 7px 13px; }
 .numbers b { display: block; font: 600 17px ui-monospace, monospace; } .numbers span { font-size: 13px; color: var(--dim); }
@@ -63,13 +63,26 @@ details.sound .tc { display: inline-block; min-width: 8.5em; font: 12.5px ui-mon
 ol.largest { columns: 2; column-gap: 40px; padding-left: 24px; margin: 8px 0; font-size: 14px; }
 ol.largest a { color: inherit; }
 [hidden] { display: none !important; }
-@media (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
-@media print { :root { color-scheme: light; --paper: #fff; --card: #fff; } .wide { overflow: visible; } body { padding: 0; font-size: 10pt; } .tools { display: none; }
-  * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2 { break-after: avoid; }
-  .steps { min-width: 0; } .steps th:nth-child(1) { width: 30px; } .steps th:nth-child(2) { width: 80px; }
-  .steps th:nth-child(3) { width: 220px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 90px; }
-  svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } td.tc { font-size: 8pt; }
-  tr.k td { font-size: 7.5pt; } }
+@media screen and (max-width: 1040px) { .steps { min-width: 0; } .steps th:nth-child(1) { width: 44px; }
+  .steps th:nth-child(3) { width: 184px; } .steps td:nth-child(3) { white-space: normal; }
+  .steps th:nth-child(5), .steps th:nth-child(6) { width: 112px; } .steps td, .steps th { padding-left: 6px; padding-right: 6px; } }
+@media screen and (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
+@media screen and (max-width: 900px) { .steps, .steps tbody { display: block; } .steps thead { display: none; }
+  .steps tr { display: grid; grid-template-columns: 34px 106px 1fr auto auto; column-gap: 14px; padding: 6px 0; border-bottom: 1px solid var(--line); }
+  .steps td, .steps tr.k td { padding: 0; border: 0; } .steps td:nth-child(5) { grid-area: 1 / 4; } .steps td:nth-child(6) { grid-area: 1 / 5; }
+  .steps td:nth-child(4) { grid-column: 3 / 6; } }
+@media screen and (max-width: 600px) { .steps tr { grid-template-columns: 28px 1fr auto auto; column-gap: 10px; }
+  .steps td:nth-child(5) { grid-area: 1 / 3; } .steps td:nth-child(6) { grid-area: 1 / 4; }
+  .steps td:nth-child(3), .steps td:nth-child(4) { grid-column: 2 / 5; } }
+@media print { :root { color-scheme: light; --paper: #fff; --card: #fff; } .wide { overflow: visible; } body { padding: 0; font-size: 10pt; }
+  .tools { margin: 4px 0; font-size: 8pt; } .tools button, .tools span, .tools input, .tools label:has(input:not(:checked)) { display: none; }
+  * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2, h2 + p, thead { break-after: avoid; }
+  .steps { min-width: 0; } .steps th:nth-child(1) { width: 40px; } .steps th:nth-child(2) { width: 84px; }
+  .steps th:nth-child(3) { width: 150px; } .steps td:nth-child(3) { white-space: normal; }
+  .steps th:nth-child(5), .steps th:nth-child(6) { width: 88px; }
+  svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } th { font-size: 8pt; } td.tc { font-size: 8pt; }
+  tr.k td { font-size: 7.5pt; } .tag { font-size: 7.5pt; } ol.largest, details.sound { font-size: 8pt; } details.sound .tc { font-size: 7.5pt; }
+  details.sound ul { margin: 1px 0 2px; padding-left: 6px; } }
 )";
 
 const std::string_view NotesPage::Script = R"(
@@ -78,17 +91,19 @@ const rows = [...document.querySelectorAll('tr[id]')], steps = rows.filter(row =
 const marks = [...svg.querySelectorAll('[data-rows]')];
 const rowsOf = mark => mark.dataset.rows ? mark.dataset.rows.split(' ') : [];
 const marksOf = id => [...svg.querySelectorAll(`[data-rows~="${id}"]`)];
-const reelNumbers = [...document.querySelectorAll('.reels b')];
+const reelNumbers = [...document.querySelectorAll('.reels')].map(strip =>
+  [...strip.querySelectorAll('b')].sort((a, b) => a.dataset.at - b.dataset.at));
 let left = 0, width = whole, at = -1;
 function show() {
   width = Math.min(whole, Math.max(whole / 2000, width));
   left = Math.min(whole - width, Math.max(0, left));
   svg.setAttribute('viewBox', `${left} 0 ${width} 190`);
-  reelNumbers.forEach(number => {
-    const at = (number.dataset.at - left) / width;
+  reelNumbers.forEach(strip => strip.forEach((number, i) => {
+    const at = (number.dataset.at - left) / width, end = i + 1 < strip.length ? (strip[i + 1].dataset.at - left) / width : 1;
     number.style.left = `${at * 100}%`;
-    number.hidden = at < 0 || at > 1;
-  });
+    number.hidden = false;
+    number.hidden = at < 0 || at > 1 || (end - at) * number.parentElement.clientWidth < number.offsetWidth;
+  }));
 }
 function zoom(factor, middle = left + width / 2) {
   const share = (middle - left) / width;
@@ -155,11 +170,15 @@ function filter() {
     !shown.has(mark.classList[0]) || rowsOf(mark).every(id => left.has(id))));
   const note = document.querySelector('.left'), off = boxes.filter(b => !b.checked);
   note.hidden = off.length === 0;
-  note.textContent = `Left out: lines that are only ${off.map(b => b.parentElement.innerText.trim()).join(', ')}, ` +
+  const kinds = off.map(b => b.parentElement.textContent.trim());
+  const list = kinds.length > 1 ? `${kinds.slice(0, -1).join(', ')} or ${kinds.at(-1)}` : kinds[0];
+  note.textContent = `Left out: lines that are only ${list}, ` +
     `and ${off.length > 1 ? 'those colours' : 'that colour'} in the picture. ${steps.filter(row => !row.hidden).length} of ${steps.length} steps are shown.`;
 }
 boxes.forEach(box => box.addEventListener('change', filter));
 show();
+addEventListener('resize', show);
+addEventListener('beforeprint', show);
 document.querySelectorAll('[data-zoom]').forEach(b => b.addEventListener('click', () => zoom(+b.dataset.zoom)));
 document.querySelectorAll('a[href^="#s"]').forEach(a => a.addEventListener('click', e => {
   e.preventDefault(); e.stopPropagation(); choose(a.hash.slice(1), true); reveal(a.hash.slice(1)); }));

@@ -11,6 +11,8 @@
 #include <algorithm>
 #include <array>
 #include <functional>
+#include <iterator>
+#include <numeric>
 #include <optional>
 #include <string>
 #include <utility>
@@ -29,9 +31,10 @@ constexpr double FootHeight = 22;
 constexpr double StripHeight = 14;
 constexpr double BandHeight = 84;
 constexpr double LineHeight = 10.5;
+/// A printer with 600 dots to the inch has about as many across the paper. More bands can't be told from each other.
+constexpr std::size_t MostBands = 4000;
 /// A step with more lines goes on over the page.
 constexpr std::size_t MostLinesOfAPiece = 24;
-constexpr std::size_t MostCharactersOfATitle = 70;
 /// Of what stands above the rows of a reel that goes on from the page before.
 constexpr double ContinuedHeight = 30;
 
@@ -40,7 +43,7 @@ constexpr PdfColour White{1.0, 1.0, 1.0};
 constexpr PdfColour Dim{0.42, 0.45, 0.48};
 constexpr PdfColour Rule{0.85, 0.84, 0.82};
 constexpr PdfColour Kept{0.49, 0.58, 0.68};
-constexpr PdfColour Band{0.49, 0.58, 0.68, 0.34};
+constexpr PdfColour Staying{0.49, 0.58, 0.68, 0.34};
 constexpr PdfColour Moved{0.83, 0.54, 0.12, 0.7};
 constexpr PdfColour Doubled{0.54, 0.36, 0.75, 0.7};
 constexpr PdfColour Lifted{0.78, 0.27, 0.23};
@@ -89,6 +92,17 @@ public:
 
 private:
     using Lines = std::vector<std::pair<std::string, PdfColour>>;
+    /// From where picture was to where it is.
+    struct Band {
+        FrameSpan inOld;
+        FrameSpan inNew;
+        PdfColour colour;
+    };
+    /// Of a strip of the picture.
+    struct Stretch {
+        double left;
+        double right;
+    };
 
     void add(double height, std::function<void(PdfPages&, double)> draw, bool goesWithNext = false)
     {
@@ -116,7 +130,7 @@ private:
     {
         const core::NoteTotals& totals = m_document.notes.totals();
         const auto time = [this](std::int32_t frames) { return m_words.timecode(frames); };
-        const std::string titles = titleOf(false) + " to " + titleOf(true);
+        const std::string titles = concatenated({m_words.cutTitle(false), " to ", m_words.cutTitle(true)});
         m_pages.describe("Change notes: " + titles,
                          toPrintable("Old cut " + m_words.cutName(false) + ", new cut " + m_words.cutName(true)).text);
         addText("Change notes", TitleFont, Ink, 22);
@@ -136,17 +150,8 @@ private:
         }
         for (const std::string& line : m_words.settings())
             addText(line, BodyFont, Dim, 13);
-        addText(m_words.order(), BodyFont, Ink, 13);
-    }
-
-    /// What the files of a cut call it, or their names where they don't; of many titles the first and the last.
-    std::string titleOf(bool isNew) const
-    {
-        const std::vector<std::string>& titles = isNew ? m_document.cuts.newTitles : m_document.cuts.oldTitles;
-        if (titles.empty())
-            return toPrintable(m_words.cutName(isNew)).text;
-        const std::string first = toPrintable(titles.front(), MostCharactersOfATitle).text;
-        return titles.size() == 1 ? first : first + " ... " + toPrintable(titles.back(), MostCharactersOfATitle).text;
+        if (const std::string order = m_words.order(); !order.empty())
+            addText(order, BodyFont, Ink, 13);
     }
 
     double xOf(std::int32_t frame) const
@@ -158,14 +163,36 @@ private:
 
     void drawBox(const FrameSpan& frames, double top, const PdfColour& colour)
     {
-        const double left = xOf(frames.start);
-        m_pages.box(left, top, std::max(0.3, xOf(frames.end()) - left), StripHeight, colour);
+        const Stretch stretch = stretchOf(frames);
+        m_pages.box(stretch.left, top, stretch.right - stretch.left, StripHeight, colour);
     }
 
-    void drawBand(const FrameSpan& inOld, const FrameSpan& inNew, double top, const PdfColour& colour)
+    /// The frames are wide enough to be seen.
+    Stretch stretchOf(const FrameSpan& frames) const
     {
-        m_pages.band(xOf(inOld.start), xOf(inOld.end()), top, xOf(inNew.start), xOf(inNew.end()), top + BandHeight,
-                     colour);
+        const double left = xOf(frames.start);
+        return {left, std::max(left + 0.3, xOf(frames.end()))};
+    }
+
+    /// Draws stretches that touch as one.
+    void drawBoxes(std::vector<Stretch> stretches, double top, const PdfColour& colour)
+    {
+        std::sort(stretches.begin(), stretches.end(),
+                  [](const Stretch& a, const Stretch& b) { return a.left < b.left; });
+        for (std::size_t first = 0; first < stretches.size();) {
+            double right = stretches[first].right;
+            std::size_t next = first + 1;
+            for (; next < stretches.size() && stretches[next].left <= right; ++next)
+                right = std::max(right, stretches[next].right);
+            m_pages.box(stretches[first].left, top, right - stretches[first].left, StripHeight, colour);
+            first = next;
+        }
+    }
+
+    void drawBand(const Band& band, double top)
+    {
+        m_pages.band(xOf(band.inOld.start), xOf(band.inOld.end()), top, xOf(band.inNew.start), xOf(band.inNew.end()),
+                     top + BandHeight, band.colour);
     }
 
     void drawPicture(double top)
@@ -174,24 +201,20 @@ private:
         const double bandTop = oldTop + StripHeight;
         const double newTop = bandTop + BandHeight;
         m_pages.text(Margin, oldTop - 4, "old cut", SmallFont, Dim);
-        m_pages.text(Margin, newTop + StripHeight + 10, "new cut", SmallFont, Dim);
         drawLegend(newTop + StripHeight + 10);
         drawBox({0, m_document.notes.oldCut().length()}, oldTop, Kept);
         drawBox({0, m_document.notes.newCut().length()}, newTop, Kept);
-        std::vector<FrameSpan> moves;
-        for (const core::ReelNotes& reel : m_document.notes.reels()) {
-            for (const NoteEntry& entry : reel.entries) {
-                if (entry.step() != nullptr && entry.step()->action == core::StepAction::Move)
-                    moves.push_back(*entry.step()->changes.front().inNew);
-            }
+        std::vector<Band> bands = allBands();
+        std::string below = "new cut";
+        if (bands.size() > MostBands) {
+            below += concatenated(
+                {", the ", std::to_string(MostBands), " longest of ", std::to_string(bands.size()), " bands"});
+            keepLongest(bands);
         }
-        std::sort(moves.begin(), moves.end(), [](const FrameSpan& a, const FrameSpan& b) { return a.start < b.start; });
-        for (const bool drawsMoves : {false, true}) {
-            for (const core::ReelNotes& reel : m_document.notes.reels()) {
-                for (const NoteEntry& entry : reel.entries)
-                    drawEntry(entry, moves, drawsMoves, oldTop, newTop);
-            }
-        }
+        m_pages.text(Margin, newTop + StripHeight + 10, below, SmallFont, Dim);
+        for (const Band& band : bands)
+            drawBand(band, bandTop);
+        drawChanges(oldTop, newTop);
         if (m_document.notes.reels().size() > 1)
             drawReelStarts(oldTop, newTop);
     }
@@ -218,7 +241,10 @@ private:
         const auto mark = [this](const core::Programme& cut, std::size_t place, std::size_t reel, double top) {
             const double x = xOf(cut.reels()[place].start);
             m_pages.box(x, top, 0.7, StripHeight, Ink);
-            m_pages.text(x + 2, top + 9.5, std::to_string(reel + 1), ReelFont, White);
+            const std::string number = std::to_string(reel + 1);
+            // A short reel has no room for it.
+            if (x + 2 + m_pages.widthOf(number, ReelFont) <= xOf(cut.reels()[place].end()))
+                m_pages.text(x + 2, top + 9.5, number, ReelFont, White);
         };
         for (std::size_t reel = 0; reel < reels.size(); ++reel) {
             if (reels[reel].pair.oldReel)
@@ -228,33 +254,98 @@ private:
         }
     }
 
-    void drawEntry(const NoteEntry& entry, const std::vector<FrameSpan>& moves, bool drawsMoves, double oldTop,
-                   double newTop)
+    /// What the steps take out of the old strip and put into the new one.
+    void drawChanges(double oldTop, double newTop)
     {
-        const double bandTop = oldTop + StripHeight;
-        if (const core::KeptStretch* const kept = entry.kept()) {
-            const auto after =
-                std::upper_bound(moves.begin(), moves.end(), kept->newStart,
-                                 [](std::int32_t frame, const FrameSpan& move) { return frame < move.start; });
-            const bool isMoved = after != moves.begin() && kept->newStart < (after - 1)->end();
-            if (isMoved == drawsMoves)
-                drawBand({kept->oldStart, kept->length}, {kept->newStart, kept->length}, bandTop,
-                         isMoved ? Moved : Band);
-            return;
+        std::vector<Stretch> lifted;
+        std::vector<Stretch> inserted;
+        std::vector<Stretch> versions;
+        for (const core::ReelNotes& reel : m_document.notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                const core::NoteStep* const step = entry.step();
+                if (step == nullptr || step->action == core::StepAction::Move)
+                    continue;
+                for (const FrameSpan& removed : step->removedFrames)
+                    lifted.push_back(stretchOf(removed));
+                if (step->inserted.length > 0)
+                    (step->action == core::StepAction::Relabel ? versions : inserted)
+                        .push_back(stretchOf(step->inserted));
+            }
         }
-        if (entry.step() == nullptr)
+        drawBoxes(std::move(lifted), oldTop, Lifted);
+        drawBoxes(std::move(inserted), newTop, Inserted);
+        drawBoxes(std::move(versions), newTop, Version);
+    }
+
+    /// In the new cut, in order.
+    std::vector<FrameSpan> spansOfMoves() const
+    {
+        std::vector<FrameSpan> moves;
+        for (const core::ReelNotes& reel : m_document.notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                if (entry.step() != nullptr && entry.step()->action == core::StepAction::Move)
+                    moves.push_back(*entry.step()->changes.front().inNew);
+            }
+        }
+        std::sort(moves.begin(), moves.end(), [](const FrameSpan& a, const FrameSpan& b) { return a.start < b.start; });
+        return moves;
+    }
+
+    /// In the order in which they are drawn: what has moved lies over what stays.
+    std::vector<Band> allBands() const
+    {
+        const std::vector<FrameSpan> moves = spansOfMoves();
+        std::vector<Band> bands;
+        std::vector<Band> over;
+        for (const core::ReelNotes& reel : m_document.notes.reels()) {
+            for (const NoteEntry& entry : reel.entries) {
+                if (const core::KeptStretch* const kept = entry.kept()) {
+                    const bool isMoved = isIn(moves, kept->newStart);
+                    (isMoved ? over : bands)
+                        .push_back({{kept->oldStart, kept->length},
+                                    {kept->newStart, kept->length},
+                                    isMoved ? Moved : Staying});
+                }
+                addDoubled(entry, over);
+            }
+        }
+        bands.insert(bands.end(), over.begin(), over.end());
+        return bands;
+    }
+
+    /// Whether one of the spans, which are in order, has the frame.
+    static bool isIn(const std::vector<FrameSpan>& spans, std::int32_t frame)
+    {
+        const auto after = std::upper_bound(spans.begin(), spans.end(), frame,
+                                            [](std::int32_t at, const FrameSpan& span) { return at < span.start; });
+        return after != spans.begin() && frame < std::prev(after)->end();
+    }
+
+    static void addDoubled(const NoteEntry& entry, std::vector<Band>& bands)
+    {
+        if (entry.step() == nullptr || entry.step()->action == core::StepAction::Move)
             return;
-        const core::NoteStep& step = *entry.step();
-        if (!drawsMoves || step.action == core::StepAction::Move)
-            return;
-        for (const FrameSpan& removed : step.removedFrames)
-            drawBox(removed, oldTop, Lifted);
-        if (step.inserted.length > 0)
-            drawBox(step.inserted, newTop, step.action == core::StepAction::Relabel ? Version : Inserted);
-        for (const PictureChange& change : step.changes) {
+        for (const PictureChange& change : entry.step()->changes) {
             if (change.kind == core::ChangeKind::Doubled)
-                drawBand(*change.inOld, *change.inNew, bandTop, Doubled);
+                bands.push_back({*change.inOld, *change.inNew, Doubled});
         }
+    }
+
+    /// Of equal ones the first. They stay in their order.
+    static void keepLongest(std::vector<Band>& bands)
+    {
+        std::vector<std::size_t> order(bands.size());
+        std::iota(order.begin(), order.end(), std::size_t{0});
+        std::stable_sort(order.begin(), order.end(), [&bands](std::size_t a, std::size_t b) {
+            return bands[a].inNew.length > bands[b].inNew.length;
+        });
+        order.resize(MostBands);
+        std::sort(order.begin(), order.end());
+        std::vector<Band> longest;
+        longest.reserve(order.size());
+        for (const std::size_t index : order)
+            longest.push_back(bands[index]);
+        bands = std::move(longest);
     }
 
     void addLargest()
@@ -382,29 +473,35 @@ private:
             const ChangeWords words = m_words.describe(change);
             const std::string text =
                 concatenated({words.shot, ": ", words.what, words.more.empty() ? "" : ", ", words.more});
-            for (const std::string& line : m_pages.wrapped(text, SmallFont, m_right - Margin - 92))
-                lines.emplace_back(line, Ink);
+            addWrapped(text, Ink, lines);
         }
         if (entry.step()->joined > 1)
             lines.emplace_back(
-                concatenated({"joined from ", std::to_string(entry.step()->joined), " trims that cancel out"}), Dim);
-        if (m_document.layout.showsFeet)
-            lines.emplace_back(m_words.inFeet(entry), Dim);
+                concatenated({"joined from ", std::to_string(entry.step()->joined), " steps whose trims cancel out"}),
+                Dim);
+        if (const std::string feet = m_words.inFeet(entry); m_document.layout.showsFeet && !feet.empty())
+            addWrapped(feet, Dim, lines);
         if (const core::StepSound* const sound = m_words.soundOf(entry))
             addSound(*sound, lines);
         return lines;
     }
 
-    void addSound(const core::StepSound& sound, Lines& lines) const
+    void addWrapped(const std::string& text, const PdfColour& colour, Lines& lines)
+    {
+        for (const std::string& line : m_pages.wrapped(text, SmallFont, m_right - Margin - 92))
+            lines.emplace_back(line, colour);
+    }
+
+    void addSound(const core::StepSound& sound, Lines& lines)
     {
         if (!sound.scenes.empty())
-            lines.emplace_back("scene: " + SoundWording::scenes(sound), Dim);
+            addWrapped("scene: " + SoundWording::scenes(sound), Dim, lines);
         if (sound.isEmpty())
             return;
         const SoundWording words(*m_document.sound);
-        lines.emplace_back("sound: " + words.summary(sound), Ink);
+        addWrapped("sound: " + words.summary(sound), Ink, lines);
         for (const SoundLine& line : words.lines(sound))
-            lines.emplace_back(concatenated({"    ", line.time, "  ", line.name, ": ", line.what}), Dim);
+            addWrapped(concatenated({"    ", line.time, "  ", line.name, ": ", line.whatAndMore()}), Dim, lines);
         if (const std::string rest = SoundWording::rest(sound); !rest.empty())
             lines.emplace_back("    " + rest, Dim);
     }
@@ -424,8 +521,7 @@ private:
     {
         if (entry.number > 0)
             m_pages.textToRight(Margin + 20, y, std::to_string(entry.number), BodyFont, colour);
-        m_pages.text(Margin + 28, y, m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel))), font,
-                     colour);
+        m_pages.text(Margin + 28, y, m_words.timeOf(entry, reel), font, colour);
         m_pages.text(Margin + 92, y, m_words.action(entry), font, colour);
         if (entry.lengthChange != 0)
             m_pages.textToRight(m_lengthRight, y, m_words.change(entry.lengthChange), font, colour);

@@ -23,7 +23,7 @@ constexpr std::size_t NumberWidth = 4;
 constexpr std::size_t TimeWidth = 13;
 constexpr std::size_t ActionWidth = 35;
 constexpr std::size_t WhatWidth = 33;
-constexpr std::size_t SoundWhatWidth = 21;
+constexpr std::size_t SoundWhatWidth = 25;
 constexpr std::size_t SoundTimeWidth = 14;
 const std::string Indent(NumberWidth + 2, ' ');
 
@@ -94,7 +94,8 @@ public:
         sink(cuts());
         sink(figures());
         sink(soundTotals());
-        sink(concatenated({"\n", wrapped(m_words.order(), {})}));
+        if (const std::string order = m_words.order(); !order.empty())
+            sink(concatenated({"\n", wrapped(order, {})}));
         sink(largest());
         sink(reels());
         for (std::size_t reel = 0; reel < m_document.notes.reels().size(); ++reel) {
@@ -128,8 +129,10 @@ private:
 
     std::string cuts() const
     {
-        return longLine("Old cut", m_words.cutText(false)) + longLine("New cut", m_words.cutText(true)) +
-               line("Frame rate", m_document.rate) + m_document.settings.text(padded("Settings", 12), Width);
+        const std::string titles = m_words.titles();
+        return (titles.empty() ? titles : longLine("Titles", titles)) + longLine("Old cut", m_words.cutText(false)) +
+               longLine("New cut", m_words.cutText(true)) + line("Frame rate", m_document.rate) +
+               m_document.settings.text(padded("Settings", 12), Width);
     }
 
     std::string figures() const
@@ -193,9 +196,7 @@ private:
     std::string rowText(const NoteEntry& entry, std::size_t reel) const
     {
         const std::string number = entry.number == 0 ? "" : numberText(entry.number);
-        const std::string start =
-            padded(number, Indent.size()) +
-            padded(m_words.timecode(m_document.notes.timecodeOf(m_words.placeOf(entry, reel))), TimeWidth);
+        const std::string start = padded(number, Indent.size()) + padded(m_words.timeOf(entry, reel), TimeWidth);
         // Only a step has a change of length, so that there is room for longer words in its place.
         if (entry.step() == nullptr)
             return trimmedEnd(start + padded(m_words.action(entry), ActionWidth + 1 + TimeWidth) +
@@ -212,9 +213,9 @@ private:
                 text += wrapped(Indent + "  " + words.more, Indent + "  ");
         }
         if (entry.step()->joined > 1)
-            text += Indent + "joined from " + std::to_string(entry.step()->joined) + " trims that cancel out\n";
-        if (m_document.layout.showsFeet)
-            text += wrapped(Indent + m_words.inFeet(entry), Indent + "  ");
+            text += Indent + "joined from " + std::to_string(entry.step()->joined) + " steps whose trims cancel out\n";
+        if (const std::string feet = m_words.inFeet(entry); m_document.layout.showsFeet && !feet.empty())
+            text += wrapped(Indent + feet, Indent + "  ");
         if (const core::StepSound* const sound = m_words.soundOf(entry))
             text += soundText(*sound);
         return text;
@@ -236,9 +237,10 @@ private:
         const SoundWording words(*m_document.sound);
         text += wrapped(Indent + "sound: " + words.summary(sound), Indent + "  ");
         for (const SoundLine& line : words.lines(sound))
-            text += wrapped(Indent + "  " + padded(line.what, SoundWhatWidth) + " " +
-                                padded(line.time, SoundTimeWidth) + " " + line.name,
-                            Indent + "    ");
+            text +=
+                wrapped(Indent + "  " + padded(line.what, SoundWhatWidth) + " " + padded(line.time, SoundTimeWidth) +
+                            " " + line.name + (line.more.empty() ? "" : ", " + line.more),
+                        Indent + "    ");
         if (const std::string rest = SoundWording::rest(sound); !rest.empty())
             text += Indent + "  " + rest + "\n";
         return text;

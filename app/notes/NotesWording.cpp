@@ -9,6 +9,7 @@
 #include "app/settings/SettingsReport.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/MatchedName.h"
+#include "core/notes/EventPicture.h"
 #include "core/time/Timecode.h"
 
 #include <algorithm>
@@ -33,19 +34,20 @@ namespace {
 
 constexpr std::int32_t FramesPerFoot = 16;
 constexpr std::size_t MostCharactersOfAName = 39;
+constexpr std::size_t MostCharactersOfATitle = 70;
 /// The files of a cut are named one by one up to so many.
 constexpr std::size_t MostFilesNamed = 3;
 /// So many events with the same doubt are named, and so many lines that were not read.
 constexpr std::size_t MostOfAKind = 5;
 
-constexpr std::array<std::string_view, 13> KindWords{
+constexpr std::array<std::string_view, 14> KindWords{
     "head-trimmed", "tail-trimmed", "lifted",          "inserted",         "replaced",           "moved",
     "doubled",      "retimed",      "version-changed", "transition-added", "transition-removed", "transition-changed",
-    "unchanged"};
-constexpr std::array<std::string_view, 3> ActionWords{"replace", "move", "relabel"};
+    "unchanged",    "reel-moved"};
+constexpr std::array<std::string_view, 4> ActionWords{"replace", "move", "relabel", "move-reel"};
 constexpr std::array<std::string_view, 5> DoubtWords{"no-picture", "flawed", "reversed", "nameless", "covered"};
-static_assert(static_cast<std::size_t>(ChangeKind::Unchanged) + 1 == KindWords.size());
-static_assert(static_cast<std::size_t>(StepAction::Relabel) + 1 == ActionWords.size());
+static_assert(static_cast<std::size_t>(ChangeKind::ReelMoved) + 1 == KindWords.size());
+static_assert(static_cast<std::size_t>(StepAction::MoveReel) + 1 == ActionWords.size());
 static_assert(static_cast<std::size_t>(PictureDoubt::Covered) + 1 == DoubtWords.size());
 
 /// "-20 frames", "+1 frame".
@@ -57,6 +59,30 @@ std::string signedFrames(std::int32_t frames)
 std::string percent(double speed)
 {
     return std::to_string(std::lround(speed * 100));
+}
+
+/// The texts that aren't empty, with commas between.
+std::string listed(std::initializer_list<std::string> texts)
+{
+    std::string all;
+    for (const std::string& text : texts)
+        all.append(all.empty() || text.empty() ? "" : ", ").append(text);
+    return all;
+}
+
+/// "dissolve of 16".
+std::string transitionOf(const EventBase& shot)
+{
+    return (shot.transitionType() == TransitionType::Wipe ? "wipe of " : "dissolve of ") +
+           std::to_string(shot.transitionDuration());
+}
+
+/// "with a dissolve of 16 frames", where a shot brings or takes one with it.
+std::string withTransition(bool hasTransition, const EventBase* shot, const char* with = "with a ")
+{
+    if (!hasTransition || shot == nullptr)
+        return {};
+    return concatenated({with, transitionOf(*shot), shot->transitionDuration() == 1 ? " frame" : " frames"});
 }
 
 /// A name and how many more there are: "42A-3 MAREN MCU and 2 more".
@@ -163,6 +189,14 @@ std::string NotesWording::feet(std::int32_t frames)
     return std::to_string(frames / FramesPerFoot) + (rest < 10 ? "+0" : "+") + std::to_string(rest);
 }
 
+std::string NotesWording::timeOf(const NoteEntry& entry, std::size_t reel) const
+{
+    const auto& notes = m_document.notes;
+    if (entry.step() != nullptr && entry.step()->action == StepAction::MoveReel)
+        return timecode(notes.oldTimecode(entry.step()->changes.front().inOld->start));
+    return timecode(notes.timecodeOf(placeOf(entry, reel), reel));
+}
+
 WorkPlace NotesWording::placeOf(const NoteEntry& entry, std::size_t reel) const
 {
     if (const core::KeptStretch* const kept = entry.kept())
@@ -192,8 +226,10 @@ std::string NotesWording::action(const NoteEntry& entry) const
             step.from.reel == step.place.reel ? step.from.frame < step.place.frame : entry.lengthChange < 0;
         const WorkPlace& other = goesFurtherOn ? step.place : step.from;
         return "move " + timecode(step.moved) + (goesFurtherOn ? " to " : " from ") +
-               timecode(m_document.notes.timecodeOf(other));
+               timecode(m_document.notes.timecodeOf(other, step.reel()));
     }
+    case StepAction::MoveReel:
+        return "move the whole reel to " + timecode(m_document.notes.newTimecode(step.changes.front().inNew->start));
     case StepAction::Relabel:
         return "new version, " + timecode(step.inserted.length);
     case StepAction::Replace:
@@ -233,8 +269,10 @@ std::string NotesWording::inFeet(const NoteEntry& entry) const
             return step->from.reel == step->place.reel ? std::string() : " of reel " + std::to_string(reel + 1);
         };
         return concatenated({"take out ", through(step->from.frame, step->moved), inReel(step->from.reel),
-                             ", insert at ", feet(place), inReel(step->place.reel)});
+                             ", put in from ", feet(place), inReel(step->place.reel)});
     }
+    case StepAction::MoveReel:
+        return {};
     case StepAction::Relabel:
         return "new version from " + through(place, step->inserted.length);
     case StepAction::Replace:
@@ -246,19 +284,50 @@ std::string NotesWording::inFeet(const NoteEntry& entry) const
     return text;
 }
 
-std::string NotesWording::transitionText(const PictureChange& change) const
+std::string NotesWording::transitionText(const PictureChange& change)
 {
-    const auto lengthOf = [](const EventBase* shot) {
-        return shot == nullptr ? std::string("?") : std::to_string(shot->transitionDuration());
-    };
-    const EventBase* const named = change.kind == ChangeKind::TransitionRemoved ? change.oldShot : change.newShot;
-    const std::string type =
-        named != nullptr && named->transitionType() == TransitionType::Wipe ? "wipe of " : "dissolve of ";
+    const EventBase* const was = change.oldShot;
+    const EventBase* const now = change.newShot;
     if (change.kind == ChangeKind::TransitionAdded)
-        return type + lengthOf(change.newShot) + " frames added";
+        return now == nullptr ? "transition added" : transitionOf(*now) + " frames added";
     if (change.kind == ChangeKind::TransitionRemoved)
-        return type + lengthOf(change.oldShot) + " frames removed";
-    return type + lengthOf(change.oldShot) + " now " + lengthOf(change.newShot) + " frames";
+        return was == nullptr ? "transition removed" : transitionOf(*was) + " frames removed";
+    if (was == nullptr || now == nullptr)
+        return "other transition";
+    if (was->transitionType() != now->transitionType())
+        return transitionOf(*was) + " now " + transitionOf(*now);
+    // Its shots are others, or go on in each other elsewhere.
+    if (was->transitionDuration() == now->transitionDuration())
+        return transitionOf(*was) + ", other picture";
+    return concatenated({transitionOf(*was), " now ", std::to_string(now->transitionDuration()), " frames"});
+}
+
+/// "speed 100 now 50 %"; a freeze has no speed.
+std::string NotesWording::speedText(const EventBase& was, const EventBase& now) const
+{
+    const core::Framerate& framerate = m_document.notes.framerate();
+    if (core::isFreeze(now, framerate))
+        return concatenated({"speed ", percent(was.signedSpeed()), " % now freeze"});
+    if (core::isFreeze(was, framerate))
+        return concatenated({"freeze now speed ", percent(now.signedSpeed()), " %"});
+    return concatenated({"speed ", percent(was.signedSpeed()), " now ", percent(now.signedSpeed()), " %"});
+}
+
+/// Of new picture; empty at normal speed.
+std::string NotesWording::ownSpeedText(const EventBase* shot) const
+{
+    if (shot == nullptr || shot->hasSpeed(1.0))
+        return {};
+    if (core::isFreeze(*shot, m_document.notes.framerate()))
+        return "freeze";
+    return concatenated({"speed ", percent(shot->signedSpeed()), " %"});
+}
+
+/// Which version of a VFX shot stood there, where it is another than now.
+std::string NotesWording::formerVersion(const PictureChange& change) const
+{
+    const std::string was = versionName(change.oldShot);
+    return was == versionName(change.newShot) ? std::string() : "as " + toPrintable(was, MostCharactersOfAName).text;
 }
 
 /// The name in which its version stands.
@@ -278,6 +347,22 @@ std::string NotesWording::materialOf(const PictureChange& change) const
                          onScreen(source->toString(), m_document.notes.framerate())});
 }
 
+/// Names both versions where the shot has a new one.
+ChangeWords NotesWording::retimeWords(const PictureChange& change) const
+{
+    const std::string oldVersion = versionName(change.oldShot);
+    const std::string newVersion = versionName(change.newShot);
+    const auto printable = [](const std::string& name) { return toPrintable(name, MostCharactersOfAName).text; };
+    const bool isNewVersion = oldVersion != newVersion;
+    const std::string transition = withTransition(change.hasNewTransition, change.newShot);
+    const std::string former = withTransition(change.hasOldTransition, change.oldShot);
+    return {
+        speedText(*change.oldShot, *change.newShot), isNewVersion ? printable(newVersion) : nameOf(change.newShot),
+        listed({"was " + (isNewVersion ? printable(oldVersion) + ", " : "") + timecode(change.inOld->length) + " long",
+                "is " + timecode(change.inNew->length), materialOf(change), transition,
+                former == transition ? "" : withTransition(change.hasOldTransition, change.oldShot, "had a ")})};
+}
+
 ChangeWords NotesWording::describe(const PictureChange& change) const
 {
     const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
@@ -289,40 +374,42 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
         return {"head " + signedFrames(change.frames), name, {}};
     case ChangeKind::TailTrimmed:
         return {"tail " + signedFrames(change.frames), name, {}};
-    case ChangeKind::Lifted:
+    case ChangeKind::Lifted: {
+        const std::string transition = withTransition(change.hasOldTransition, change.oldShot);
         // With its place, a part would be wider than the column.
         if (change.isPart)
-            return {"lifted part " + length, nameOf(change.oldShot), "in the old cut" + oldPlace()};
-        return {"lifted " + length + oldPlace(), nameOf(change.oldShot), {}};
-    case ChangeKind::Inserted: {
-        std::string more = materialOf(change);
-        if (shot != nullptr && !shot->hasSpeed(1.0))
-            more += concatenated({", speed ", percent(shot->signedSpeed()), " %"});
-        return {"inserted " + length, name, more};
+            return {"lifted part " + length, nameOf(change.oldShot),
+                    listed({"in the old cut" + oldPlace(), transition})};
+        return {"lifted " + length + oldPlace(), nameOf(change.oldShot), transition};
     }
+    case ChangeKind::Inserted:
+        return {
+            "inserted " + length, name,
+            listed({materialOf(change), ownSpeedText(shot), withTransition(change.hasNewTransition, change.newShot)})};
     case ChangeKind::Replaced:
         return {"replaced " + length, name,
-                concatenated({materialOf(change), change.newShot == nullptr ? "" : ", ", "was ", nameOf(change.oldShot),
-                              oldPlace()})};
+                listed({materialOf(change), withTransition(change.hasNewTransition, change.newShot),
+                        "was " + nameOf(change.oldShot) + oldPlace(),
+                        withTransition(change.hasOldTransition, change.oldShot)})};
     case ChangeKind::Moved:
         return {"moved " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)),
                 "in the old cut" + oldPlace()};
     case ChangeKind::Unchanged:
         return {"unchanged " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)), {}};
     case ChangeKind::Doubled:
-        return {"once more " + length, name, "stood once in the old cut" + oldPlace()};
+        return {"once more " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)),
+                listed({"stood once in the old cut" + oldPlace(), formerVersion(change)})};
     case ChangeKind::Retimed:
-        return {"speed " + percent(change.oldShot->signedSpeed()) + " now " + percent(change.newShot->signedSpeed()) +
-                    " %",
-                name,
-                concatenated({"was ", timecode(change.inOld->length), " long, is ", timecode(change.inNew->length),
-                              ", ", materialOf(change)})};
+        return retimeWords(change);
     case ChangeKind::VersionChanged:
         return {"was " + toPrintable(versionName(change.oldShot), 28).text,
                 toPrintable(versionName(change.newShot), MostCharactersOfAName).text,
                 {}};
-    case ChangeKind::TransitionAdded:
+    case ChangeKind::ReelMoved:
+        return {length + (change.frames < 0 ? " earlier" : " later"), "the whole reel", {}};
     case ChangeKind::TransitionRemoved:
+        return {transitionText(change), nameOf(change.oldShot), {}};
+    case ChangeKind::TransitionAdded:
     case ChangeKind::TransitionChanged:
         break;
     }
@@ -371,7 +458,12 @@ std::size_t NotesWording::stepsOf(std::size_t reel) const
 std::string NotesWording::shotsOf(const NoteEntry& entry) const
 {
     const PictureChange& largest = largestChange(entry);
-    return withMore(describe(largest).shot, core::otherShots(*entry.step(), largest));
+    if (largest.kind == ChangeKind::ReelMoved)
+        return describe(largest).what;
+    const std::size_t others = core::otherShots(*entry.step(), largest);
+    if (largest.shots == 1)
+        return withMore(describe(largest).shot, others);
+    return withMore(nameOf(largest.newShot), static_cast<std::size_t>(largest.shots - 1) + others);
 }
 
 std::string NotesWording::cutName(bool isNew) const
@@ -390,15 +482,17 @@ std::vector<std::string> NotesWording::remarks() const
         const std::string gaps =
             healing.bridgedGaps > 0 ? ", " + counted(healing.bridgedGaps, "gap") + " covered" : std::string();
         lines.push_back(
-            concatenated({"For the change EDL that cadrel makes of these cuts: ", counted(healing.events, "event"),
-                          " healed from ", std::to_string(healing.members), gaps, "; the steps above are not healed"}));
+            concatenated({m_document.sound == nullptr ? "For the change EDL that cadrel makes of these cuts: "
+                                                      : "Of the change EDL that was applied: ",
+                          counted(healing.events, "event"), " healed from ", std::to_string(healing.members), gaps,
+                          hasSteps() ? "; the steps above are not healed" : ""}));
     }
     if (const std::size_t joined = m_document.notes.joinedSteps(); joined > 0)
-        lines.push_back(std::to_string(joined) + " trims that cancel out within " +
+        lines.push_back(std::to_string(joined) + " steps whose trims cancel out within " +
                         counted(static_cast<std::size_t>(m_document.layout.simplify), "frame") + " are joined");
     for (const bool isNew : {false, true}) {
         for (const std::string& file : isNew ? m_document.cuts.newOverlapping : m_document.cuts.oldOverlapping)
-            lines.push_back(toPrintable(file, MostCharactersOfAName).text +
+            lines.push_back(fileOf(file, isNew) +
                             " lies on the same timecode as another file of its cut: of what stands on top of each "
                             "other, the one that starts later is seen");
         addDoubts(isNew, lines);
@@ -421,9 +515,8 @@ void NotesWording::addUnread(bool isNew, std::vector<std::string>& lines) const
     for (const auto& [file, unreadLines] : unread) {
         for (const auto& [line, problem] : unreadLines) {
             if (++count <= MostOfAKind)
-                lines.push_back(
-                    concatenated({toPrintable(file, MostCharactersOfAName).text, ", line ", std::to_string(line.number),
-                                  " ", problem, ": \"", toPrintable(line.text, MostCharactersOfAName).text, "\""}));
+                lines.push_back(concatenated({fileOf(file, isNew), ", line ", std::to_string(line.number), " ", problem,
+                                              ": \"", toPrintable(line.text, MostCharactersOfAName).text, "\""}));
         }
     }
     if (count > MostOfAKind)
@@ -438,9 +531,9 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
     for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
         const EventBase& event = cut.events().at(static_cast<std::size_t>(doubtful.event));
         if (++counts.at(static_cast<std::size_t>(doubtful.doubt)) <= MostOfAKind)
-            lines.push_back(concatenated({toPrintable(event.edlFileName(), MostCharactersOfAName).text, ", event ",
-                                          std::to_string(event.eventNumber()), " (", nameOf(&event),
-                                          "): ", explanationOf(doubtful.doubt)}));
+            lines.push_back(
+                concatenated({fileOf(event.edlFileName(), isNew), ", event ", std::to_string(event.eventNumber()), " (",
+                              nameOf(&event), "): ", explanationOf(doubtful.doubt)}));
     }
     for (std::size_t doubt = 0; doubt < counts.size(); ++doubt) {
         if (counts[doubt] > MostOfAKind)
@@ -452,18 +545,23 @@ void NotesWording::addDoubts(bool isNew, std::vector<std::string>& lines) const
 
 std::string NotesWording::order() const
 {
-    return concatenated(
-        {"The steps are carried out in order, and their places are those in the programme so far. What is moved is "
-         "taken "
-         "out first; the place after \"to\" is counted without it. ",
-         m_document.notes.reels().size() > 1
-             ? "A reel keeps its start, whatever is put into the others or taken out of them. "
-             : "",
-         "In the lines below a step, \"at\" is a place in the old cut.",
-         m_document.sound != nullptr
-             ? " The time of a clip is its start in the old project; of what is new, and where automation jumps, it is "
-               "that of the new cut."
-             : ""});
+    std::string text;
+    const auto say = [&text](std::string_view sentence) { text.append(text.empty() ? "" : " ").append(sentence); };
+    if (hasSteps()) {
+        say("The steps are carried out in order, and their places are those in the programme so far. What is moved is "
+            "taken out first; the place after \"to\" is counted without it.");
+        if (m_document.notes.reels().size() > 1)
+            say("What is put into a reel or taken out of it leaves the starts of the others where they are.");
+        say("In the lines below a step, \"at\" is a place in the old cut. The offset of a step is what the reel has "
+            "gained so far; that of kept picture is how much later it stands now than in the old cut.");
+        if (m_document.layout.showsFeet)
+            say("Feet are counted in the programme so far, from the first frame of the reel, and the last frame of a "
+                "stretch is counted in.");
+    }
+    if (m_document.sound != nullptr)
+        say("The time of a clip is its start in the old project; of what is new, and where automation jumps, it is "
+            "that of the new cut.");
+    return text;
 }
 
 std::vector<std::string> NotesWording::settings() const
@@ -478,6 +576,38 @@ std::vector<std::string> NotesWording::settings() const
             lines.push_back(concatenated({titleOf(origin), options}));
     }
     return lines;
+}
+
+std::string NotesWording::cutTitle(bool isNew) const
+{
+    const std::vector<std::string>& titles = isNew ? m_document.cuts.newTitles : m_document.cuts.oldTitles;
+    if (titles.empty())
+        return toPrintable(cutName(isNew)).text;
+    const std::string first = toPrintable(titles.front(), MostCharactersOfATitle).text;
+    return titles.size() == 1 ? first : first + " ... " + toPrintable(titles.back(), MostCharactersOfATitle).text;
+}
+
+std::string NotesWording::titles() const
+{
+    if (m_document.cuts.oldTitles.empty() && m_document.cuts.newTitles.empty())
+        return {};
+    return concatenated({cutTitle(false), " to ", cutTitle(true)});
+}
+
+bool NotesWording::hasSteps() const
+{
+    return m_document.notes.totals().steps > 0;
+}
+
+std::string NotesWording::fileOf(const std::string& file, bool isNew) const
+{
+    const auto has = [&file](const std::vector<std::string>& names) {
+        return std::find(names.begin(), names.end(), file) != names.end();
+    };
+    const std::string name = toPrintable(file, MostCharactersOfAName).text;
+    if (!has(m_document.cuts.oldNames) || !has(m_document.cuts.newNames))
+        return name;
+    return concatenated({isNew ? "New cut, " : "Old cut, ", name});
 }
 
 std::string NotesWording::cutText(bool isNew) const

@@ -47,6 +47,8 @@ public:
     /// 35 mm feet and frames, 16 frames a foot: "12+05". The first frame of a reel is 0+00.
     static std::string feet(std::int32_t frames);
 
+    /// The timecode of `placeOf`; of a step that moves its reel where the reel began.
+    std::string timeOf(const core::NoteEntry& entry, std::size_t reel) const;
     /// Where a row stands in the programme as it is then. Of a move to further on it is where the picture is taken from.
     core::WorkPlace placeOf(const core::NoteEntry& entry, std::size_t reel) const;
     /// "delete 00:00:01:00"; at the other end of a move "moved 00:00:30:00 to reel 8, step 40".
@@ -65,13 +67,17 @@ public:
     std::string reelLengths(std::size_t reel) const;
     /// What was healed, joined, doubted and passed over, a line each.
     std::vector<std::string> remarks() const;
+    /// What the files of a cut call it, or their names where they don't; of many titles the first and the last.
+    std::string cutTitle(bool isNew) const;
+    /// "REEL 3 V07 to REEL 3 V12"; empty where no file has a title.
+    std::string titles() const;
     /// The names of the files of a cut; of many the first and the last.
     std::string cutName(bool isNew) const;
     /// How many steps a reel has.
     std::size_t stepsOf(std::size_t reel) const;
     /// The shot of the largest change of a step, and how many more shots it changes: "42A-3 MAREN MCU and 2 more".
     std::string shotsOf(const core::NoteEntry& entry) const;
-    /// How the steps and the lines below them are meant.
+    /// How the steps and the lines below them are meant; empty where nothing needs to be explained.
     std::string order() const;
     /// The settings in force, a line for each place that they are from: "Settings given: --simplify 12".
     std::vector<std::string> settings() const;
@@ -89,7 +95,14 @@ public:
 private:
     std::string versionName(const core::EventBase* shot) const;
     std::string materialOf(const core::PictureChange& change) const;
-    std::string transitionText(const core::PictureChange& change) const;
+    ChangeWords retimeWords(const core::PictureChange& change) const;
+    static std::string transitionText(const core::PictureChange& change);
+    std::string speedText(const core::EventBase& was, const core::EventBase& now) const;
+    std::string ownSpeedText(const core::EventBase* shot) const;
+    std::string formerVersion(const core::PictureChange& change) const;
+    bool hasSteps() const;
+    /// The name of a file; with its cut where both have a file of that name.
+    std::string fileOf(const std::string& file, bool isNew) const;
     void addDoubts(bool isNew, std::vector<std::string>& lines) const;
     void addUnread(bool isNew, std::vector<std::string>& lines) const;
 

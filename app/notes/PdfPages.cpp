@@ -289,8 +289,8 @@ void PdfPages::band(double topLeft, double topRight, double top, double bottomLe
     cairo_move_to(context, topLeft, top);
     cairo_curve_to(context, topLeft, middle, bottomLeft, middle, bottomLeft, bottom);
     cairo_line_to(context, bottomRight, bottom);
+    // Closed by being filled. Every number of a film with thousands of bands takes time to write.
     cairo_curve_to(context, bottomRight, middle, topRight, middle, topRight, top);
-    cairo_close_path(context);
     cairo_fill(context);
 }
 

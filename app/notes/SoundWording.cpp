@@ -77,7 +77,7 @@ std::string fatesText(const core::SoundCount& count)
                                           {count.trimmed, "trimmed"},
                                           {count.split, "split"},
                                           {count.doubled, "doubled"},
-                                          {count.lost, "in no cut"},
+                                          {count.lost, "fell out"},
                                           {count.added, "new"}});
     return text.empty() ? text : ": " + text;
 }
@@ -149,12 +149,13 @@ std::vector<SoundLine> SoundWording::lines(const StepSound& sound) const
         const double time = change.kind == SoundChangeKind::Added ? change.now->start : change.was.start;
         lines.push_back({whatOf(change), timecode(time),
                          nameOf(m_document.tracks.at(change.track).name, MostCharactersOfATrack) + ": " +
-                             nameOf(change.name, MostCharactersOfAClip) + part});
+                             nameOf(change.name, MostCharactersOfAClip) + part,
+                         change.kind == SoundChangeKind::Doubled ? "now at " + timecode(change.now->start) : ""});
     }
     for (const AutomationJump& jump : sound.jumps) {
         if (lines.size() == MostLines)
             return lines;
-        lines.push_back({"automation jumps", timecode(jump.place.start), fittingList(jump.tracks)});
+        lines.push_back({"automation jumps", timecode(jump.place.start), fittingList(jump.tracks), {}});
     }
     return lines;
 }
@@ -188,7 +189,7 @@ std::string SoundWording::whatOf(const SoundChange& change) const
     case SoundChangeKind::Split:
         return lost > core::SameInstant ? "split, -" + length : "split";
     case SoundChangeKind::Doubled:
-        return "once more, at " + timecode(change.now->start) + " now";
+        return "once more";
     case SoundChangeKind::FellOut:
         return lost > core::SameInstant ? "fell out, " + length : "fell out";
     case SoundChangeKind::Added:

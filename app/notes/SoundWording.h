@@ -21,6 +21,10 @@ struct SoundLine {
     std::string what; ///< "split, -00:00:00:20"
     std::string time; ///< where the clip began in the old programme; of a jump, where it is in the new one
     std::string name; ///< "DIA 1: 42A-3 Maren"
+    std::string more; ///< "now at 03:13:05:15"; mostly empty
+
+    /// All that happened: "once more, now at 03:13:05:15".
+    std::string whatAndMore() const { return more.empty() ? what : what + ", " + more; }
 };
 
 /// Says in words what happened to the sound at a step.

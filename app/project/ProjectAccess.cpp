@@ -3,6 +3,7 @@
 #include "app/project/ProjectAccess.h"
 
 #include "app/console/Paths.h"
+#include "app/console/Terminal.h"
 #include "host/project/HostFramerate.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
@@ -31,12 +32,28 @@ void requireReadableProject(const std::string& file)
         throw unreadable(file, FileKind::Project);
 }
 
+standin::Project& readProject(const std::string& file, Terminal& terminal)
+{
+    // Deleting a long project node by node takes time; the end of the program frees it at once.
+    static standin::ChangeLog& log = *new standin::ChangeLog;
+    static standin::Project* project = nullptr;
+
+    requireReadableProject(file);
+    terminal.showProgress("reading " + fileNameOf(file));
+    try {
+        project = standin::ProjectFile::read(file, log).detach();
+    } catch (const standin::ProjectFileError& error) {
+        throw readingFailure(error, file);
+    }
+    return *project;
+}
+
 std::string projectFileIn(const std::string& path)
 {
     try {
         return standin::ProjectFile::fileIn(path).string();
     } catch (const ProjectFileError& error) {
-        throw Failure{path, faultIn(error, path), "name the project's file"};
+        throw Failure{path, faultIn(error, path), "give the project file in it"};
     }
 }
 

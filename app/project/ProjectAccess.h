@@ -16,8 +16,13 @@ class ProjectFileError;
 
 namespace cadrel::app {
 
+class Terminal;
+
 /// Throws Failure when the name can't be that of a project that may be read.
 void requireReadableProject(const std::string& file);
+
+/// Reads a project that stays to the end of the program. Throws Failure.
+standin::Project& readProject(const std::string& file, Terminal& terminal);
 
 /// The file that is meant by a path on the command line: a folder stands for the only session in it. Throws Failure.
 std::string projectFileIn(const std::string& path);

@@ -11,13 +11,13 @@
 #include "app/console/Terminal.h"
 #include "app/console/Wording.h"
 #include "app/edl/ProjectClock.h"
+#include "app/project/MediaProgram.h"
 #include "app/project/ProjectAccess.h"
 #include "app/project/ProjectContent.h"
 #include "app/project/ProjectJson.h"
 #include "app/project/ProjectListing.h"
 #include "app/project/StoredModel.h"
 #include "standin/base/Utf16.h"
-#include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 
 #include <algorithm>
@@ -31,8 +31,6 @@
 namespace cadrel::app {
 
 using standin::Project;
-using standin::ProjectFile;
-using standin::ProjectFileError;
 using standin::toUtf8;
 using standin::Track;
 
@@ -41,22 +39,6 @@ namespace {
 /// A longer list of names doesn't help to find the right one.
 constexpr std::size_t MostNamesInAMessage = 40;
 constexpr std::size_t MostCharactersOfAName = 40;
-
-Project& read(const std::string& file, Terminal& terminal)
-{
-    // Deleting a long project node by node takes time; the end of the program frees it at once.
-    static standin::ChangeLog& log = *new standin::ChangeLog;
-    static Project* project = nullptr;
-
-    requireReadableProject(file);
-    terminal.showProgress("reading " + fileNameOf(file));
-    try {
-        project = ProjectFile::read(file, log).detach();
-    } catch (const ProjectFileError& error) {
-        throw readingFailure(error, file);
-    }
-    return *project;
-}
 
 bool isNamed(const Track& track, const std::string& name)
 {
@@ -133,7 +115,9 @@ void runShow(const ShowOptions& options, Terminal& terminal)
         refuseToOverwrite({options.projectFile}, options.jsonFile);
         requireReplaceable({options.jsonFile}, {.isAllowed = options.isReplacing});
     }
-    Project& project = read(options.projectFile, terminal);
+    if (options.isMedia)
+        startMediaProgram(options.projectFile);
+    Project& project = readProject(options.projectFile, terminal);
     const ProjectClock clock = clockOf(project, options.projectFile);
     const StoredModel stored(project, clock);
     const Tracks tracks = tracksNamed(project, options);

@@ -12,6 +12,7 @@ struct ShowOptions {
     std::string projectFile;
     std::string trackName;    ///< empty: all tracks
     std::string jsonFile;     ///< empty: none is written; "-": standard output
+    bool isMedia = false;     ///< the files of its media are shown, and nothing else
     bool isReplacing = false; ///< whether a JSON file that exists may be replaced
 };
 

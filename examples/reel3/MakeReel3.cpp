@@ -4,9 +4,7 @@
 // project file. The same EDL always gives the same bytes.
 
 #include "core/edl/EventList.h"
-#include "core/time/Framerate.h"
-#include "core/time/FramerateProvider.h"
-#include "core/time/Timecode.h"
+#include "examples/reel3/CutReading.h"
 #include "examples/reel3/MixMoves.h"
 #include "examples/reel3/ProductionSound.h"
 #include "examples/reel3/ProgrammeTime.h"
@@ -20,7 +18,6 @@
 #include "standin/project/Track.h"
 #include "util/HostString.h"
 #include "util/Result.h"
-#include "util/StringConverter.h"
 #include "util/StringUtil.h"
 
 #include <array>
@@ -37,8 +34,6 @@ namespace {
 using namespace reel3;
 using namespace standin;
 using cadrel::core::EventList;
-using cadrel::core::Framerate;
-using cadrel::core::Timecode;
 using cadrel::util::StringUtil;
 using Velmark::AttributeKey;
 using Velmark::Counted;
@@ -46,16 +41,6 @@ using Velmark::makeCounted;
 
 constexpr double Hour = 3600.0;
 constexpr const char* ProgrammeEnd = "03:15:30:21";
-
-class PlainConverter : public cadrel::util::StringConverter {
-public:
-    std::wstring translate(const std::wstring& text) const override { return text; }
-};
-
-class PictureRate : public cadrel::core::FramerateProvider {
-public:
-    Framerate getFramerate() const override { return {24, 0}; }
-};
 
 struct Memo {
     const char* at;
@@ -329,9 +314,7 @@ private:
 
 void makeProject(const std::string& edl, const std::string& projectFile)
 {
-    EventList picture;
-    Framerate shown;
-    picture.load(StringUtil::toWide(edl), false, shown, false, false);
+    const EventList picture = readCut(edl);
     ChangeLog log;
     Reel reel(log);
     reel.make(picture);
@@ -346,10 +329,7 @@ int main(int argc, char** argv)
         std::cerr << "make_reel3: give the EDL of the old cut and the name of the project file\n";
         return 2;
     }
-    const PlainConverter converter;
-    const PictureRate rate;
-    StringUtil::setConverter(&converter);
-    Timecode::setFramerateProvider(&rate);
+    const EdlSetting setting;
     try {
         makeProject(argv[1], argv[2]);
         return 0;

@@ -180,7 +180,17 @@ int32 Host::projectRenamed(IProjectDocument* /*project*/)
 
 int32 Host::projectStoring(IProjectDocument* project)
 {
-    const Result::Type result = resultOf([&] { required(find(project).get())->save(); });
+    const Result::Type result = resultOf([&] {
+        const std::shared_ptr<Project> stored = find(project);
+        core::Settings& settings = required(stored.get())->model().settings();
+        const core::Settings present = settings;
+        // The bounds of a run that goes on are none of the user's.
+        if (m_restricted && m_restricted->isOf(settings))
+            settings = m_restricted->released();
+        const Result::Type saved = resultOf([&] { stored->save(); });
+        settings = present;
+        requireSuccess(saved);
+    });
     if (result != Result::Ok)
         showAlert(L"An error occurred while saving the Cadrel data.");
     return result;

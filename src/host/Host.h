@@ -5,6 +5,7 @@
 #include "core/conform/CadrelerBase.h"
 #include "core/edl/EventList.h"
 #include "core/notify/ChangeContextNotificationBase.h"
+#include "core/protect/RestrictedRange.h"
 #include "core/serialize/ByteArchive.h"
 #include "core/time/SecondsRange.h"
 #include "host/border/Teardown.h"
@@ -25,6 +26,10 @@
 #include <optional>
 #include <string>
 #include <vector>
+
+namespace cadrel::core {
+struct FrameRange;
+} // namespace cadrel::core
 
 namespace Velmark {
 class IActionManager;
@@ -186,11 +191,15 @@ private:
     void tellDropped(const std::vector<std::int32_t>& actions);
     /// Result::Cancelled when the user has cancelled it and it was taken back.
     util::Result::Type runCadrel();
+    /// Throws when the run couldn't be taken back with its note.
+    void noteRun(Project& project, const core::FrameRange& allowed, Velmark::IEditTransaction& transaction);
     util::Result::Type runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                   std::uint32_t options);
     /// With `leaving` the preview is switched off afterwards, also when it fails.
     util::Result::Type finishPreview(bool leaving);
-    /// Tell the user of what is left out: of the new video, and of what the change list carries over.
+    /// Tell the user of what is left out: of the new video, and of what the change list carries over. He may do anything
+    /// meanwhile.
+    static void tellOfOmissions(const Project& project, VideoWriting writing);
     static void tellOfVideo(VideoWriting writing);
     static void tellOfLeftOut(const Project& project);
 
@@ -240,7 +249,8 @@ private:
     std::shared_ptr<ProjectVideo> m_videoProvider; ///< never null
     bool m_processing = false;                     ///< from the begin of a transaction to the end of its commit
     bool m_runRequested = false;
-    std::optional<core::SecondsRange> m_runBounds; ///< of the run that was requested, where it has some
+    std::optional<core::SecondsRange> m_runBounds;     ///< of the run that was requested, where it has some
+    std::optional<core::RestrictedRange> m_restricted; ///< while a run with bounds goes on
     bool m_previewRequested = false;
     std::optional<std::int32_t> m_served; ///< the action of the request that is being carried out
     core::EventList m_previewEvents{core::ListKind::Change};

@@ -5,7 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
-#include "core/protect/RestrictedRange.h"
+#include "core/protect/RunRecord.h"
 #include "host/Host.h"
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
@@ -14,6 +14,7 @@
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
 #include "host/undo/PreviewEventsStep.h"
+#include "host/undo/RunNoteStep.h"
 #include "host/video/ProjectVideo.h"
 #include "host/video/VideoWriting.h"
 #include "util/FilledText.h"
@@ -144,7 +145,6 @@ Result::Type Host::startPreview(const core::EventList& events, std::uint64_t fir
         m_previewFirst = first;
         m_previewLast = last;
         m_previewOptions = options;
-        m_restorePreviewState = false;
         m_previewRequested = true;
     });
 }
@@ -185,22 +185,24 @@ Result::Type Host::runCadrel()
         return Result::NoProject;
     Project& project = *held;
     const core::EventList& changeList = project.model().changeEdl();
-    std::optional<core::RestrictedRange> restricted;
-    if (m_runBounds)
-        restricted.emplace(project.model().settings(), *m_runBounds);
-    return withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
+    VideoWriting video = VideoWriting::Done;
+    const Result::Type result = withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
+        // What the user lets change; the bounds leave out what stays as it is.
+        const core::FrameRange allowed = core::RunRecord::allowedBy(project.model().settings());
+        if (m_runBounds)
+            m_restricted.emplace(project.model().settings(), *m_runBounds);
         Counted<IActionManager> actions; // once the user has cancelled
-        VideoWriting video = VideoWriting::Done;
-        const Result::Type result = edit(project, Apply, [&](IEditTransaction& transaction) {
+        EntryName name = Apply;
+        requireSuccess(edit(project, name, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle);
             requireSuccess(removeVirginTerritoryMarkers());
             project.createMarkerTracks(transaction);
             const Result::Type ran = run(changeList);
             if (ran == Result::Cancelled) {
-                // Without them the run stays, and must not look complete. If they refuse the undo, the name was given
-                // before, and the failure alone tells of it.
                 actions = required(service<IActionManager>(m_context));
+                // It can be done again after its undo, and stays where the host refuses that.
+                name.done = name.incomplete;
                 return;
             }
             requireSuccess(ran);
@@ -211,15 +213,28 @@ Result::Type Host::runCadrel()
             double end = 0.0;
             project.getApplyRange(start, end);
             project.closeRange(isOnlySelected(project.model().settings()), start, end);
-        });
-        requireSuccess(result);
+            noteRun(project, allowed, transaction);
+        }));
         if (actions) {
             takeBack(project, *actions);
             throw Result::Cancelled;
         }
-        tellOfVideo(video);
-        tellOfLeftOut(project);
     });
+    m_restricted.reset();
+    if (result == Result::Ok)
+        tellOfOmissions(project, video);
+    return result;
+}
+
+/// The note has a step of its own, as nobody hears where the host refuses that of the model.
+void Host::noteRun(Project& project, const core::FrameRange& allowed, IEditTransaction& transaction)
+{
+    requireActive(project);
+    const std::optional<Document> document = activeDocument();
+    if (!document)
+        throw Result::NoProject;
+    requireOk(transaction.addStep(makeCounted<RunNoteStep>(document->model).get()));
+    core::RunRecord::addRun(*document->model, allowed);
 }
 
 Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
@@ -229,11 +244,12 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
     if (!held)
         return Result::NoProject;
     Project& project = *held;
-    return withProgress(project, {L"Project Preview", false}, events.size(), [&] {
-        VideoWriting video = VideoWriting::Done;
+    VideoWriting video = VideoWriting::Done;
+    const Result::Type result = withProgress(project, {L"Project Preview", false}, events.size(), [&] {
         requireSuccess(edit(project, Preview, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle, m_modelSnapshot);
+            m_restorePreviewState = false;
             requireSuccess(removeVirginTerritoryMarkers());
             project.createVideoTracks(transaction);
             project.createMarkerTracks(transaction);
@@ -251,9 +267,10 @@ Result::Type Host::runPreview(const core::EventList& events, std::uint64_t first
         }));
         requireActive(project);
         requireSuccess(cycleToEvents(events, first, last, options));
-        tellOfVideo(video);
-        tellOfLeftOut(project);
     });
+    if (result == Result::Ok)
+        tellOfOmissions(project, video);
+    return result;
 }
 
 Result::Type Host::finishPreview(bool leaving)
@@ -281,6 +298,12 @@ Result::Type Host::finishPreview(bool leaving)
             project.previewEvents().clear();
         failure.raise();
     });
+}
+
+void Host::tellOfOmissions(const Project& project, VideoWriting writing)
+{
+    tellOfVideo(writing);
+    tellOfLeftOut(project);
 }
 
 void Host::tellOfVideo(VideoWriting writing)

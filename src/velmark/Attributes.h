@@ -129,6 +129,8 @@ struct AttributeKey {
     static constexpr const char* Preview = "Cadrel:Preview";
     /// On such a track, beside it: an IAttributeData with numbers of each event.
     static constexpr const char* PreviewEvents = "Cadrel:PreviewEvents";
+    /// On such a track: an IAttributeData with the numbers of the automation curves on which something was written.
+    static constexpr const char* PreviewCurves = "Cadrel:PreviewCurves";
     /// On the project while a preview has room past its end: an IAttributeData with numbers.
     static constexpr const char* ProjectEnd = "Cadrel:ProjectEnd";
     /// In these lists: the numbers.
@@ -142,6 +144,9 @@ struct AttributeKey {
     /// On a copy of a memo in the preview stretch: a number made of what it was like when it was written or its memo followed
     /// it last.
     static constexpr const char* Followed = "Cadrel:Followed";
+    /// On an automation point that the system has written, to go once the curve runs the same without it: its value as a
+    /// number, so that one that somebody has given another value stays.
+    static constexpr const char* HeldValue = "Cadrel:HeldValue";
     /// On a marker: the reel of the change event, a text.
     static constexpr const char* Reel = "User:STR_MAReel";
 };

@@ -53,6 +53,7 @@ void copyEvents(const Track& from, double start, double end, Track& to, double d
 //      after     |- A -|           |- B -|
 void clearEvents(Track& track, double start, double end)
 {
+    std::vector<Counted<Event>> rests;
     for (const Counted<Event>& event : eventsIn(track, start, end)) {
         const Event::Stretch stretch = *event->stretchIn(start, end);
         if (stretch.start - event->start() >= SameInstant)
@@ -60,8 +61,12 @@ void clearEvents(Track& track, double start, double end)
         else
             event->remove();
         if (event->end() - stretch.end >= SameInstant)
-            event->cutOut(stretch.end, event->end())->insertInto(track);
+            rests.push_back(event->cutOut(stretch.end, event->end()));
     }
+    // They began before all that begins where they do now, and lie below it.
+    std::ranges::reverse(rests);
+    for (const Counted<Event>& rest : rests)
+        rest->insertBeforeOthers(track);
 }
 
 } // namespace

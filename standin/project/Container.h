@@ -52,7 +52,8 @@ private:
     void markChildChanged(ChangeNotes& changes, Node& child);
 
     TimeTree m_children;
-    std::uint64_t m_nextOrder = 1;
+    std::uint64_t m_nextOrder = std::uint64_t{1} << 63; ///< of what comes after all with its start
+    std::uint64_t m_previousOrder = m_nextOrder - 1;    ///< of what comes before them
 };
 
 } // namespace standin

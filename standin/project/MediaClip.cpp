@@ -49,6 +49,12 @@ IFilePath* MediaClip::getFile()
     return m_file.get();
 }
 
+void MediaClip::setFileRate(double framesPerSecond)
+{
+    m_fileRate = framesPerSecond;
+    markContentChanged();
+}
+
 MediaClip::Caption MediaClip::caption() const
 {
     const std::lock_guard lock(m_captionMutex);
@@ -57,7 +63,7 @@ MediaClip::Caption MediaClip::caption() const
 
 void MediaClip::updateCaption()
 {
-    Caption caption{name(), getFrameCount()};
+    Caption caption{name(), getFrameCount(), {m_path, m_projectFile}, m_framesPerSecond};
     const std::lock_guard lock(m_captionMutex);
     m_caption = std::move(caption);
 }

@@ -4,6 +4,7 @@
 
 #include "standin/base/FilePath.h"
 #include "standin/project/Node.h"
+#include "standin/project/VideoSupport.h"
 #include "velmark/Media.h"
 
 #include <mutex>
@@ -29,10 +30,15 @@ public:
     Kind kind() const { return m_kind; }
     const std::u16string& path() const { return m_path; }
     double seconds() const { return length(); }
-    /// What a picture of it says.
+    /// Of the file, in frames per second; 0 when it isn't known, as it is of sound.
+    double fileRate() const { return m_fileRate; }
+    void setFileRate(double framesPerSecond);
+    /// What a picture of it takes.
     struct Caption {
         std::u16string name;
         Velmark::uint32 frameCount = 0;
+        MediaReference file;
+        double framesPerSecond = 0.0; ///< of the project
     };
     /// As of the last change. For any thread, unlike all else.
     Caption caption() const;
@@ -53,6 +59,8 @@ private:
     int m_number = 0;
     Velmark::Counted<ProjectLink> m_link; ///< null when it is in no pool
     double m_framesPerSecond = 0.0;       ///< of the project, as its pool says
+    std::u16string m_projectFile;         ///< likewise
+    double m_fileRate = 0.0;
     mutable std::mutex m_captionMutex;
     Caption m_caption;
 };

@@ -2,6 +2,9 @@
 
 #include "standin/project/MediaPool.h"
 
+#include "standin/base/Text.h"
+#include "standin/project/VideoSupport.h"
+
 #include <limits>
 #include <string_view>
 
@@ -35,7 +38,23 @@ FUnknown* MediaPool::import(IFilePath* path)
         if (clip->path() == asked)
             return static_cast<FObject*>(clip.get());
     }
-    return nullptr;
+    const Counted<MediaClip> probed = probe(asked);
+    if (!probed)
+        return nullptr;
+    add(probed);
+    return static_cast<FObject*>(probed.get());
+}
+
+Counted<MediaClip> MediaPool::probe(const std::u16string& path) const
+{
+    if (!m_videos || !(m_framesPerSecond > 0.0) || !isWellFormed(path))
+        return nullptr;
+    const auto video = m_videos->probe({path, m_projectFile}, m_framesPerSecond);
+    if (!video)
+        return nullptr;
+    auto clip = makeCounted<MediaClip>(MediaClip::Kind::Video, path, video->frameCount / m_framesPerSecond);
+    clip->setFileRate(video->framesPerSecond);
+    return clip;
 }
 
 MediaClip* MediaPool::clipWith(int number) const
@@ -81,6 +100,7 @@ void MediaPool::add(Counted<MediaClip> clip, int number)
     clip->m_number = number;
     clip->m_link = m_link;
     clip->m_framesPerSecond = m_framesPerSecond;
+    clip->m_projectFile = m_projectFile;
     MediaClip& added = *clip;
     m_clips.emplace(number, std::move(clip));
     added.markContentChanged();
@@ -91,6 +111,15 @@ void MediaPool::setFrameRate(double framesPerSecond)
     m_framesPerSecond = framesPerSecond;
     for (const auto& [number, clip] : m_clips) {
         clip->m_framesPerSecond = framesPerSecond;
+        clip->updateCaption();
+    }
+}
+
+void MediaPool::setProjectFile(const std::u16string& path)
+{
+    m_projectFile = path;
+    for (const auto& [number, clip] : m_clips) {
+        clip->m_projectFile = path;
         clip->updateCaption();
     }
 }

@@ -22,7 +22,7 @@ public:
 
     Velmark::int32 count(const char* type) override;
     Velmark::IProjectNode* itemAt(Velmark::int32 index, const char* type) override;
-    /// Answers the clip of that path. One that isn't in the pool can't be brought in: this host reads no media.
+    /// Answers the clip of that path. A video that isn't in the pool is brought in if the host opens videos.
     Velmark::FUnknown* import(Velmark::IFilePath* path) override;
 
     /// In the order of their numbers.
@@ -34,14 +34,21 @@ public:
 
     /// That of the project, by which the clips count their frames. 0 at first.
     void setFrameRate(double framesPerSecond);
+    /// Where the project is stored, beside which its media may lie; empty at first.
+    void setProjectFile(const std::u16string& path);
+    /// Null at first. It outlives the pool, or is taken away before.
+    void setVideoSupport(VideoSupport* videos) { m_videos = videos; }
 
 private:
+    Velmark::Counted<MediaClip> probe(const std::u16string& path) const;
     int freeNumber() const;
     /// The clips of the type word, in the order of their numbers.
     std::span<MediaClip* const> clipsOf(const char* type);
 
     Velmark::Counted<ProjectLink> m_link;
     double m_framesPerSecond = 0.0;
+    std::u16string m_projectFile;
+    VideoSupport* m_videos = nullptr;
     std::map<int, Velmark::Counted<MediaClip>> m_clips;
     // What clipsOf gives, so that a walk over a large pool by index takes no time.
     std::vector<MediaClip*> m_audio;

@@ -76,6 +76,8 @@ public:
     /// Takes the node out of its container, if it is in one, and puts it into another, after all that start at the same
     /// time. The container must accept it.
     void insertInto(Container& parent);
+    /// The same, before all that start at the same time.
+    void insertBeforeOthers(Container& parent);
     /// Takes `former` out of its container, in which it must be, and goes into it instead. Of two that start together it is
     /// in the same place among all that do.
     void takePlaceOf(Node& former)

@@ -87,6 +87,11 @@ void Node::insertInto(Container& parent)
     moveTo({&parent, parent.m_nextOrder++});
 }
 
+void Node::insertBeforeOthers(Container& parent)
+{
+    moveTo({&parent, parent.m_previousOrder--});
+}
+
 void Node::remove()
 {
     if (m_parent)

@@ -147,6 +147,12 @@ bool Project::accepts(const Node& child) const
     return dynamic_cast<const Track*>(&child) != nullptr;
 }
 
+void Project::setPath(std::u16string path)
+{
+    m_path = std::move(path);
+    m_pool->setProjectFile(m_path);
+}
+
 void Project::setForm(std::unique_ptr<ProjectForm> form)
 {
     m_form = std::move(form);

@@ -53,7 +53,7 @@ public:
 
     /// Where it is stored; empty for a project that never was.
     const std::u16string& path() const { return m_path; }
-    void setPath(std::u16string path) { m_path = std::move(path); }
+    void setPath(std::u16string path);
     /// Null for the host's own form.
     ProjectForm* form() const { return m_form.get(); }
     void setForm(std::unique_ptr<ProjectForm> form);

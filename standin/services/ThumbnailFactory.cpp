@@ -2,106 +2,20 @@
 
 #include "standin/services/ThumbnailFactory.h"
 
-#include "standin/services/BitmapFont.h"
+#include "standin/services/ThumbnailImage.h"
 
-#include <algorithm>
 #include <string>
+#include <vector>
 
 namespace standin {
 
 using namespace Velmark;
 
-namespace {
-
-constexpr int BytesPerPixel = 4;
-constexpr uint8 Ground[BytesPerPixel] = {0x58, 0x48, 0x38, 0xff}; ///< a dark blue
-constexpr uint8 Ink[BytesPerPixel] = {0xff, 0xff, 0xff, 0xff};
-
-/// From one character to the next, and from one line to the next.
-constexpr int Advance = BitmapFont::Width + 1;
-constexpr int LineAdvance = BitmapFont::Height + 2;
-
-std::size_t byteOffset(int x, int y, int width)
-{
-    return (static_cast<std::size_t>(y) * static_cast<std::size_t>(width) + static_cast<std::size_t>(x)) *
-           BytesPerPixel;
-}
-
-} // namespace
-
-ThumbnailImage::ThumbnailImage(int width, int height, std::u16string_view firstLine, std::u16string_view secondLine)
-    : m_width(width), m_height(height), m_pixels(byteOffset(0, height, width))
-{
-    for (std::size_t offset = 0; offset < m_pixels.size(); offset += BytesPerPixel)
-        std::copy_n(Ground, BytesPerPixel, m_pixels.begin() + static_cast<std::ptrdiff_t>(offset));
-    const std::size_t longest = std::max({firstLine.size(), secondLine.size(), std::size_t{1}});
-    const int across = static_cast<int>(static_cast<std::size_t>(width) / (longest * Advance));
-    const int scale = std::max(1, std::min(across, height / (2 * LineAdvance)));
-    drawLine(firstLine, height / 2 - BitmapFont::Height * scale - scale, scale);
-    drawLine(secondLine, height / 2 + scale, scale);
-}
-
-int32 ThumbnailImage::getSize(int32 size[2])
-{
-    if (!size)
-        return ResultFalse;
-    size[0] = m_width;
-    size[1] = m_height;
-    return ResultOk;
-}
-
-int32 ThumbnailImage::read(void* pixels, int32 stride, const int32 rect[4], int32 /*reserved*/)
-{
-    if (!pixels || !rect)
-        return ResultFalse;
-    const int32 left = rect[0];
-    const int32 top = rect[1];
-    const int32 right = rect[2];
-    const int32 bottom = rect[3];
-    const bool isWithin =
-        left >= 0 && left <= right && right <= m_width && top >= 0 && top <= bottom && bottom <= m_height;
-    if (!isWithin || stride / BytesPerPixel < right - left)
-        return ResultFalse;
-    auto* row = static_cast<uint8*>(pixels);
-    for (int y = top; y < bottom; ++y, row += stride) {
-        const auto source = m_pixels.begin() + static_cast<std::ptrdiff_t>(byteOffset(left, y, m_width));
-        std::copy_n(source, (right - left) * BytesPerPixel, row);
-    }
-    return ResultOk;
-}
-
-void ThumbnailImage::drawLine(std::u16string_view text, int top, int scale)
-{
-    // What doesn't fit even at the smallest scale is cut off at its end.
-    text = text.substr(0, static_cast<std::size_t>(std::max(1, m_width / (Advance * scale))));
-    int left = (m_width - static_cast<int>(text.size()) * Advance * scale) / 2;
-    for (const char16_t character : text) {
-        for (int column = 0; column < BitmapFont::Width; ++column) {
-            for (int row = 0; row < BitmapFont::Height; ++row) {
-                if (BitmapFont::isSet(character, column, row))
-                    fill(left + column * scale, top + row * scale, scale);
-            }
-        }
-        left += Advance * scale;
-    }
-}
-
-void ThumbnailImage::fill(int left, int top, int size)
-{
-    for (int y = std::max(top, 0); y < std::min(top + size, m_height); ++y) {
-        for (int x = std::max(left, 0); x < std::min(left + size, m_width); ++x)
-            std::copy_n(Ink, BytesPerPixel, m_pixels.begin() + static_cast<std::ptrdiff_t>(byteOffset(x, y, m_width)));
-    }
-}
-
 int32 ThumbnailFactory::setSource(IMediaClip* clip, const int32 size[2])
 {
     m_caption = {};
     const auto* const video = dynamic_cast<MediaClip*>(clip);
-    if (!video || video->kind() != MediaClip::Kind::Video || !size)
-        return ResultFalse;
-    const auto fits = [](int32 side) { return side >= 1 && side <= LongestSide; };
-    if (!fits(size[0]) || !fits(size[1]))
+    if (!video || video->kind() != MediaClip::Kind::Video || !ThumbnailImage::isSize(size))
         return ResultFalse;
     m_caption = video->caption();
     m_width = size[0];
@@ -114,8 +28,8 @@ IThumbnailImage* ThumbnailFactory::getImage(uint32 frame)
     if (frame >= m_caption.frameCount)
         return nullptr;
     const std::string number = std::to_string(frame);
-    return makeCounted<ThumbnailImage>(m_width, m_height, m_caption.name, std::u16string(number.begin(), number.end()))
-        .detach();
+    const std::vector<std::u16string> lines{m_caption.name, std::u16string(number.begin(), number.end())};
+    return makeCounted<ThumbnailImage>(m_width, m_height, lines).detach();
 }
 
 } // namespace standin

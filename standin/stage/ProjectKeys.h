@@ -63,8 +63,8 @@ inline constexpr std::array ProjectKeys{Key::Format,    Key::Version,     Key::N
                                         Key::Position,  Key::LeftLocator, Key::RightLocator, Key::CycleStart,
                                         Key::CycleEnd,  Key::Selected,    Key::Attributes,   Key::Pool,
                                         Key::Tracks};
-inline constexpr std::array PoolClipKeys{Key::Number, Key::Kind,     Key::Name,      Key::Path,
-                                         Key::Length, Key::Selected, Key::Attributes};
+inline constexpr std::array PoolClipKeys{Key::Number,          Key::Kind,     Key::Name,      Key::Path, Key::Length,
+                                         Key::FramesPerSecond, Key::Selected, Key::Attributes};
 inline constexpr std::array TrackKeys{Key::Kind,       Key::Name,   Key::Locked, Key::Selected,
                                       Key::Attributes, Key::Curves, Key::Events, Key::Tracks};
 /// What a curve automates can only be told when its number has a name.

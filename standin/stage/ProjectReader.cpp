@@ -116,6 +116,8 @@ void ProjectReader::readClip(const JsonMembers& members)
         members.refuse(Key::Kind, "is " + quoted(kind) + ", which is no kind of clip");
     const auto clip = makeCounted<MediaClip>(kind == TypeWord::Audio ? MediaClip::Kind::Audio : MediaClip::Kind::Video,
                                              toUtf16(members.text(Key::Path)), timeIn(members, Key::Length));
+    if (members.has(Key::FramesPerSecond))
+        clip->setFileRate(members.number(Key::FramesPerSecond, LowestFrameRate, HighestFrameRate));
     readDetails(members, *clip, PoolClipKeys);
     m_project.pool().add(clip, number);
 }

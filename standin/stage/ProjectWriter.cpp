@@ -142,6 +142,8 @@ void ProjectWriter::writeClip(const MediaClip& clip)
     writeText(Key::Name, clip.name());
     writeText(Key::Path, clip.path());
     writeSeconds(Key::Length, clip.seconds());
+    if (clip.fileRate() != 0.0)
+        writeNumber(Key::FramesPerSecond, clip.fileRate(), LowestFrameRate, HighestFrameRate);
     writeDetails(clip, PoolClipKeys, Layout::OneLine);
     m_json.endObject();
 }

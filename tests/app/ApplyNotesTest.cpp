@@ -131,21 +131,76 @@ TEST(ApplyNotes, TellAtEachStepWhatHappenedToTheSound)
 
     const std::string text = sound.notes(".txt");
 
-    EXPECT_TRUE(tells(text, "Sound       scene.stage, 5 clips: 1 stay, 3 moved, 1 trimmed, 2 split, 1 in no\n"
-                            "            cut\n"))
+    EXPECT_TRUE(tells(text, "Sound       scene.stage, 5 clips: 1 stay, 3 moved, 1 trimmed, 2 split, 1 fell\n"
+                            "            out\n"))
         << text;
     EXPECT_TRUE(tells(text, "   1  01:00:10:00  delete 00:00:02:00                  -00:00:02:00 -00:00:02:00\n"
                             "      head -48 frames                    TWO\n"
                             "      sound: 1 split, 1 fell out, on DIA\n"
-                            "        split, -00:00:02:00   01:00:08:00    DIA: long line\n"
-                            "        fell out, 00:00:01:00 01:00:10:12    DIA: lost\n"))
+                            "        split, -00:00:02:00       01:00:08:00    DIA: long line\n"
+                            "        fell out, 00:00:01:00     01:00:10:12    DIA: lost\n"))
         << text;
     EXPECT_TRUE(tells(text, "      inserted 00:00:04:00               NEW\n"
                             "        roll B009, source 05:00:00:00\n"
                             "      sound: 1 split, on DIA\n"
-                            "        split                 01:00:18:00    DIA: over the cut\n"))
+                            "        split                     01:00:18:00    DIA: over the cut\n"))
         << text;
     EXPECT_FALSE(tells(text, "where no picture did")) << text;
+}
+
+TEST(ApplyNotes, ADoubledClipTellsItsOldTimeFirstAndItsNewOneAfterItsName)
+{
+    // The weir stands once more at the end of the example.
+    const TempFolder folder;
+    const auto notes = [&folder](const char* file) {
+        const Outcome outcome = runCadrel(
+            {"apply", treePath("examples/reel3/reel3.stage"), "--old", treePath("examples/reel3/reel3_v07.edl"),
+             "--new", treePath("examples/reel3/reel3_v12.edl"), "--vfx", "VFX_****_v,_comp", "--notes", folder / file});
+        EXPECT_EQ(outcome.status, 0) << outcome.err;
+        return unbroken(contentOf(folder / file));
+    };
+
+    EXPECT_TRUE(tells(notes("notes.txt"), " once more 03:00:06:02 FX 1: weir roar, close, now at 03:13:05:15 "));
+    EXPECT_TRUE(tells(notes("notes.html"), "<span class=\"tc\">03:00:06:02</span> <bdi>FX 1: weir roar, close</bdi> "
+                                           "<small>once more, now at 03:13:05:15</small>"));
+    EXPECT_TRUE(tells(notes("notes.csv"), "FX 1: weir roar, close at 03:00:06:02: once more, now at 03:13:05:15"));
+}
+
+TEST(ApplyNotes, TheHealingIsThatOfTheChangeEdlThatWasApplied)
+{
+    // The last shot is cut in two in both cuts.
+    const std::string first = cut("001", "A001", "01:00:00:00 01:00:08:00", "01:00:00:00 01:00:08:00");
+    const std::string before = first + cut("002", "A002", "01:00:00:00 01:00:02:00", "01:00:08:00 01:00:10:00") +
+                               cut("003", "A003", "01:00:00:00 01:00:02:00", "01:00:10:00 01:00:12:00") +
+                               cut("004", "A003", "01:00:02:00 01:00:05:00", "01:00:12:00 01:00:15:00");
+    const std::string after = first + cut("002", "A003", "01:00:00:00 01:00:02:00", "01:00:08:00 01:00:10:00") +
+                              cut("003", "A003", "01:00:02:00 01:00:05:00", "01:00:10:00 01:00:13:00");
+    const Sound sound;
+    const std::string oldFile = sound.folder.write("a.edl", before);
+    const std::string newFile = sound.folder.write("b.edl", after);
+
+    const Outcome outcome =
+        runCadrel({"apply", sound.project, "--old", oldFile, "--new", newFile, "--notes", sound.folder / "notes.txt"});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    const std::string text = unbroken(contentOf(sound.folder / "notes.txt"));
+    EXPECT_TRUE(tells(text, "Of the change EDL that was applied: 1 event healed from 2; the steps above")) << text;
+    EXPECT_FALSE(tells(text, "For the change EDL")) << text;
+}
+
+TEST(ApplyNotes, LongLinesOfTheSoundAreWrappedOnPaper)
+{
+    const auto wide = [](const char* name) { return track("audio", name, clip("room", 3608, 3614)); };
+    const Sound sound("WIDE WINDOW WASH WALL A", "long line",
+                      {wide("WIDE WINDOW WASH WALL B"), wide("WIDE WINDOW WASH WALL C"),
+                       wide("WIDE WINDOW WASH WALL D"), wide("WIDE WINDOW WASH WALL E")});
+
+    sound.notes(".pdf");
+
+    const std::string paper = unbroken(textOfPdf(sound.folder / "notes.pdf"));
+    EXPECT_TRUE(tells(paper, "sound: 5 split, 1 fell out, on WIDE WINDOW WASH WALL A, WIDE WINDOW WASH WALL B, "
+                             "WIDE WINDOW WASH WALL C, WIDE WINDOW WASH WALL D and 1 more"))
+        << paper;
 }
 
 TEST(ApplyNotes, TheHeadTellsOfWhichCutTheTimesOfTheSoundAre)
@@ -255,7 +310,7 @@ TEST(ApplyNotes, ThePageFoldsTheSoundUnderItsStep)
 
     EXPECT_TRUE(tells(
         page, "<details class=\"sound\"><summary><span class=\"tag sound\">sound</span>1 split, 1 fell out, on DIA"
-              "</summary><ul><li><span class=\"tc\">01:00:08:00</span> DIA: long line "
+              "</summary><ul><li><span class=\"tc\">01:00:08:00</span> <bdi>DIA: long line</bdi> "
               "<small>split, -00:00:02:00</small></li>"))
         << page;
     EXPECT_TRUE(tells(page, "<button data-sound>"));
@@ -284,7 +339,7 @@ TEST(ApplyNotes, NamesCantBreakThePageOrActInASpreadsheet)
 
     const std::string page = sound.notes(".html");
     EXPECT_FALSE(tells(page, "<script>\"&"));
-    EXPECT_TRUE(tells(page, "=CMD(): &lt;script&gt;&quot;&amp;?[31m? <small>")) << page;
+    EXPECT_TRUE(tells(page, "=CMD(): &lt;script&gt;&quot;&amp;?[31m?</bdi> <small>")) << page;
 
     const std::string csv = sound.notes(".csv");
     EXPECT_TRUE(tells(csv, ",'@SUM(1),0,1,0,1,0,0,'=CMD(),0,\"'=CMD(): <script>\"\"&?[31m? at 01:00:08:00: split"))
@@ -352,9 +407,10 @@ TEST(ApplyNotes, WhatChangesWhereNoPictureDidIsToldElsewhere)
     ASSERT_EQ(elsewhere.at("changes").size(), 1U);
     EXPECT_EQ(elsewhere.at("changes")[0].at("kind"), "fell-out");
     EXPECT_EQ(elsewhere.at("changes")[0].at("name"), "tail pop");
-    EXPECT_TRUE(tells(sound.notes(".txt", keepCut), "\nSound that changed where no picture did\n"
-                                                    "      sound: 1 fell out, on Tail\n"
-                                                    "        fell out, 00:00:05:00 01:00:40:00    Tail: tail pop\n"));
+    EXPECT_TRUE(tells(sound.notes(".txt", keepCut),
+                      "\nSound that changed where no picture did\n"
+                      "      sound: 1 fell out, on Tail\n"
+                      "        fell out, 00:00:05:00     01:00:40:00    Tail: tail pop\n"));
     EXPECT_TRUE(tells(sound.notes(".html", keepCut), "<h2>Sound that changed where no picture did</h2>\n<details"));
     EXPECT_TRUE(tells(sound.notes(".csv", keepCut), "\r\n,,elsewhere,,,,,,,,,,,,,,,,,,,,,,,,0,0,0,1,0,0,Tail,0,"));
 }

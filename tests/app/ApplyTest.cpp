@@ -177,7 +177,7 @@ Places placesOn(const std::string& track, const std::filesystem::path& project)
     return places;
 }
 
-/// "was -> now, now" for all that a report tells of a track, with "nothing" for what is in no cut.
+/// "was -> now, now" for all that a report tells of a track, with "nothing" for what fell out.
 Words changesOf(const json& report, const std::string& track)
 {
     Words changes;
@@ -310,8 +310,8 @@ Settings    default       --tracks all --match roll --heal normal --vfx none --n
                           --dissolve-wipe-markers --automation-markers --snippet-markers --overlap-markers --b-roll
                           --keep all
 Applied     2 events
-Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 in no cut
-Own markers 3: 1 stay, 1 moved, 1 in no cut
+Clips       10: 2 stay, 7 moved, 1 trimmed, 2 split, 1 fell out
+Own markers 3: 1 stay, 1 moved, 1 fell out
 New markers 2 Destination, 1 Insert
 Written     no project; give -o PROJECT.stage or --in-place
 
@@ -329,17 +329,17 @@ The largest changes
 
 Clip by clip
 
-track                              holds  stay  moved  trimmed  split  doubled  in no cut  new
-DIA (audio, in Dialogue)               6     1      4        1      2                   1
+track                              holds  stay  moved  trimmed  split  doubled  fell out  new
+DIA (audio, in Dialogue)               6     1      4        1      2                  1
 FX (audio)                             3            3
 Guide (audio, locked)                  1     1
-Memos (marker, in Cadrel Markers)      3     1      1                                   1
+Memos (marker, in Cadrel Markers)      3     1      1                                  1
 
 DIA (audio, in Dialogue)
   was in       was out      now in       now out      shift         clip or marker   became
   01:00:08:00  01:00:14:00  01:00:08:00  01:00:10:00                long line        moved, trimmed by 00:00:02:00 in the middle, split
                             01:00:10:00  01:00:12:00  -00:00:02:00  long line
-  01:00:10:12  01:00:11:12                                          lost line        in no cut
+  01:00:10:12  01:00:11:12                                          lost line        fell out
   01:00:13:00  01:00:16:00  01:00:11:00  01:00:14:00  -00:00:02:00  answer           moved
   01:00:18:00  01:00:21:00  01:00:16:00  01:00:18:00  -00:00:02:00  over the cut     moved, split
                             01:00:22:00  01:00:23:00  +00:00:02:00  over the cut
@@ -353,7 +353,7 @@ FX (audio)
 
 Memos (marker, in Cadrel Markers)
   was in       was out      now in       now out      shift         clip or marker   became
-  01:00:11:00                                                       cut it?          in no cut
+  01:00:11:00                                                       cut it?          fell out
   01:00:13:00               01:00:11:00               -00:00:02:00  again            moved
 
 Destination, 2 markers
@@ -1307,7 +1307,7 @@ TEST(Apply, AProjectThatCantBeReadIsRefused)
     const std::string none = scene.folder / "none.stage";
     EXPECT_EQ(refusal(none), "cadrel: " + none + ": no such file; check the name and the folder\n");
     EXPECT_EQ(refusal(scene.folder.path()),
-              "cadrel: " + scene.folder.path().string() + ": is a folder; give the project file in it\n");
+              "cadrel: " + scene.folder.path().string() + ": is a folder without a session; give the project file in it\n");
     EXPECT_TRUE(tells(refusal(scene.oldFile), "take an intact copy, or the version of Cadrel that wrote it\n"));
     const std::string empty = scene.folder.write("empty.stage", projectAt(24, false, false, 3600));
     EXPECT_EQ(refusal(empty),

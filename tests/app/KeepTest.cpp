@@ -439,6 +439,30 @@ TEST(Keep, OfTheSmallExampleEachReelMovesWithItsPopAndItsTail)
     EXPECT_TRUE(tells(contentOf(example + "README.md"), moves.substr(0, moves.find("\n\n")))) << moves;
 }
 
+TEST(Keep, OfTheSmallExampleEachReelMovesWithItsPopAndItsTailThoughAClipSpansBoth)
+{
+    const TempFolder folder;
+    const std::string example = treePath("examples/tworeels/");
+    json project = json::parse(contentOf(example + "tworeels.stage"));
+    project["tracks"].push_back(audioTrack("Old video", {clip("old video", 60, 3680)}));
+    const std::string file = folder.write("spanned.stage", project.dump());
+    const auto result = folder / "result.stage";
+
+    const Outcome outcome =
+        runCadrel({"apply", file, "--old", example + "old.edl", "--new", example + "new.edl", "-o", result});
+
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_EQ(placesOn("FX", result),
+              (Words{"leader 52-57", "2-pop 58-58.5", "pier 60-70", "lamp 74-84", "lamp goes out 84.5-85.5",
+                     "boat 86-96", "tail pop 98-98.5", "leader 2 3652-3657", "2-pop 2 3658-3658.5", "stairs 3660-3670",
+                     "door 3670-3678", "tail pop 2 3680-3680.5"}));
+    // Reel 1 has grown by four seconds, for which the gap has no room; reel 2 has lost two seconds.
+    EXPECT_EQ(placesOn("Old video", result),
+              (Words{"old video 60-70", "old video 74-3652", "old video 3652-3670", "old video 3670-3678"}));
+    EXPECT_TRUE(tells(outcome.out, "01:59:48:00")) << outcome.out;
+    EXPECT_TRUE(tells(outcome.out, "01:59:52:00")) << outcome.out;
+}
+
 TEST(Keep, TheReportHoldsWhereEachStretchOfTheListIsFrom)
 {
     const Job job(threeShots(), withInsert(), soundOfThreeShots());

@@ -168,6 +168,28 @@ TEST(NotesPdf, OnlyAReelWhereNothingHasChangedIsGrey)
               (std::vector<std::string>{"#1c1e21", "#1c1e21", "#6b727a"}));
 }
 
+/// The shots of `manyShots`, the last one first.
+std::string shotsInReverse(int count)
+{
+    std::string text;
+    for (int shot = 0; shot < count; ++shot)
+        text += cut("001", std::string("R").append(std::to_string(count - 1 - shot)), "10:00:00:12 10:00:01:12",
+                    secondsOn(shot) + " " + secondsOn(shot + 1));
+    return text;
+}
+
+TEST(NotesPdf, OfMoreBandsThanThePaperHasDotsTheLongestAreDrawn)
+{
+    const auto textOf = [](int shots) {
+        const Cuts film(manyShots(shots), shotsInReverse(shots));
+        film.file(".pdf", {"--rate", "24 fps"});
+        return unbroken(textOfPdf(film.folder / "notes.pdf"));
+    };
+
+    EXPECT_EQ(textOf(4000).find(" longest"), std::string::npos);
+    EXPECT_NE(textOf(4001).find("new cut, the 4000 longest of 4001 bands kept moved"), std::string::npos);
+}
+
 TEST(NotesPdf, TheSameNotesAreTheSameFileWhateverTheTime)
 {
     const Cuts film(oldCut(), newCut());

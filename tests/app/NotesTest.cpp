@@ -9,6 +9,7 @@
 #include <array>
 #include <cstddef>
 #include <cstdio>
+#include <filesystem>
 #include <gtest/gtest.h>
 #include <map>
 #include <nlohmann/json.hpp>
@@ -422,6 +423,29 @@ TEST(Notes, ARetimedShotTellsItsLengthsItsRollAndItsSource)
         << text;
 }
 
+TEST(Notes, ARetimedShotOfANewVersionNamesBothVersions)
+{
+    const auto shot = [](const char* version, const char* source) {
+        const std::string name = "VFX_0310_" + std::string(version) + "_comp";
+        return std::regex_replace(oldCut(), std::regex("A002  V  C  11:00:00:12 11:00:10:12"),
+                                  name + "  V  C  " + source);
+    };
+    const std::string from = shot("v012", "11:00:00:12 11:00:10:12");
+    const std::string to = shot("v013", "11:00:00:12 11:00:05:12");
+    const auto expectLines = [](const Outcome& notes, const std::string& lines) {
+        EXPECT_NE(notes.out.find(lines), std::string::npos) << notes.out << notes.err;
+    };
+
+    expectLines(Cuts(from, to).notes({"--vfx", "VFX_****_v,_comp"}),
+                "      speed 100 now 50 %                 VFX_0310_v013_comp\n"
+                "        was VFX_0310_v012_comp, 00:00:10:00 long, is 00:00:10:00, roll\n"
+                "        VFX_0310_v013_comp, source 11:00:00:12\n");
+    expectLines(Cuts(from, shot("v012", "11:00:00:12 11:00:05:12")).notes({"--vfx", "VFX_****_v,_comp"}),
+                "      speed 100 now 50 %                 TWO\n"
+                "        was 00:00:10:00 long, is 00:00:10:00, roll VFX_0310_v012_comp, source\n"
+                "        11:00:00:12\n");
+}
+
 TEST(Notes, NamesTheFirstFiveOfManyEventsThatAreDoubted)
 {
     std::string sound;
@@ -640,7 +664,8 @@ TEST(Notes, ThePlaceThatAMoveGoesToIsCountedWithoutIt)
 
 TEST(Notes, OfSeveralReelsTheHeadTellsThatEachKeepsItsStart)
 {
-    const std::string sentence = "A reel keeps its start, whatever is put into the others or taken out of them.";
+    const std::string sentence =
+        "What is put into a reel or taken out of it leaves the starts of the others where they are.";
     const TwoReels two;
     const Cuts one(oldCut(), newCut());
 
@@ -651,20 +676,209 @@ TEST(Notes, OfSeveralReelsTheHeadTellsThatEachKeepsItsStart)
         EXPECT_EQ(unbroken(form).find(sentence), std::string::npos) << form;
 }
 
+/// A shot that comes out of the one before by a dissolve, in one line.
+std::string dissolve(const std::string& number, const std::string& roll, const std::string& frames,
+                     const std::string& source, const std::string& record)
+{
+    return number + "  " + roll + " V     D    " + frames + " " + source + " " + record +
+           "\n* FROM CLIP NAME: " + roll + "\n* TO CLIP NAME: " + roll + "\n";
+}
+
+TEST(Notes, AReelThatBeginsElsewhereIsMovedThereByItsFirstStep)
+{
+    const Cuts film("FCM: NON-DROP FRAME\n" + cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00"),
+                    "FCM: NON-DROP FRAME\n" +
+                        cut("001", "LEADER", "00:00:00:00 00:00:08:00", "00:59:52:00 01:00:00:00") +
+                        cut("002", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00"));
+    const std::vector<std::string> rate{"--rate", "24 fps"};
+
+    const std::string text = film.notes(rate).out;
+    const std::string csv = film.file(".csv", rate);
+    const json notes = json::parse(film.file(".json", rate));
+
+    EXPECT_NE(text.find("   1  01:00:00:00  move the whole reel to 00:59:52:00                00:00:00:00\n"
+                        "      00:00:08:00 earlier                the whole reel\n"
+                        "   2  00:59:52:00  insert 00:00:08:00                  +00:00:08:00 +00:00:08:00\n"),
+              std::string::npos)
+        << text;
+    EXPECT_NE(text.find("01:00:00:00  kept 00:00:10:00, was 01:00:00:00"), std::string::npos) << text;
+    EXPECT_NE(csv.find("\n1,1,move-reel,00:59:52:00,01:00:00:00,,,,0,0,0,0,0,reel-moved,,,01:00:00:00,00:59:52:00,"
+                       "the whole reel: 00:00:08:00 earlier,0+00,0+00,1,1,24 fps,\r"),
+              std::string::npos)
+        << csv;
+    const json& step = notes.at("reels")[0].at("rows")[0];
+    EXPECT_EQ(step.at("action"), "move-reel");
+    EXPECT_EQ(step.at("from").at("timecode"), "01:00:00:00");
+    EXPECT_EQ(step.at("at").at("timecode"), "00:59:52:00");
+    EXPECT_EQ(step.at("changes"), json::parse(R"([{"kind": "reel-moved", "frames": -192,
+        "old": {"in": "01:00:00:00", "frames": 240}, "new": {"in": "00:59:52:00", "frames": 432}}])"));
+    const std::string page = film.file(".html", rate);
+    EXPECT_NE(page.find("<td class=\"tc\">01:00:00:00</td><td class=\"tc\">move the whole reel to 00:59:52:00</td>"),
+              std::string::npos);
+}
+
+TEST(Notes, ADissolveThatComesWithItsShotIsTold)
+{
+    const std::string first = cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
+    const Cuts film(first, first + dissolve("002", "BL", "024", "00:00:00:00 00:00:02:00", "01:00:10:00 01:00:12:00"));
+
+    const std::string text = film.notes({"--rate", "24 fps"}).out;
+
+    EXPECT_NE(unbroken(text).find("inserted 00:00:02:00 BL roll BL, source 00:00:00:00, with a dissolve of 24 frames"),
+              std::string::npos)
+        << text;
+}
+
+TEST(Notes, ADissolveThatGoesWithItsShotIsTold)
+{
+    const std::string first = cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
+    const Cuts film(first + dissolve("002", "B", "001", "00:00:00:00 00:00:02:00", "01:00:10:00 01:00:12:00"),
+                    first + dissolve("002", "C", "016", "00:00:00:00 00:00:02:00", "01:00:10:00 01:00:12:00"));
+    const Cuts lift(first + dissolve("002", "B", "001", "00:00:00:00 00:00:02:00", "01:00:10:00 01:00:12:00"), first);
+
+    const std::string text = unbroken(film.notes({"--rate", "24 fps"}).out);
+    const std::string lifted = unbroken(lift.notes({"--rate", "24 fps"}).out);
+
+    EXPECT_NE(text.find("replaced 00:00:02:00 C roll C, source 00:00:00:00, with a dissolve of 16 frames, was B at "
+                        "01:00:10:00, with a dissolve of 1 frame"),
+              std::string::npos)
+        << text;
+    EXPECT_NE(lifted.find("lifted 00:00:02:00 at 01:00:10:00 B with a dissolve of 1 frame"), std::string::npos)
+        << lifted;
+}
+
+TEST(Notes, AnotherTransitionSaysWhatItWasAndWhatItIs)
+{
+    const std::string first = cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
+    const std::string other = cut("001", "C", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
+    const std::string second = dissolve("002", "B", "024", "00:00:00:00 00:00:05:00", "01:00:10:00 01:00:15:00");
+    std::string wipe = second;
+    wipe.replace(wipe.find("D    024"), 8, "W001 024");
+
+    const std::string toWipe = Cuts(first + second, first + wipe).notes({"--rate", "24 fps"}).out;
+    const std::string ofOther = Cuts(first + second, other + second).notes({"--rate", "24 fps"}).out;
+
+    EXPECT_NE(toWipe.find("      dissolve of 24 now wipe of 24      B\n"), std::string::npos) << toWipe;
+    EXPECT_NE(ofOther.find("      dissolve of 24, other picture      B\n"), std::string::npos) << ofOther;
+}
+
+TEST(Notes, AFreezeHasNoSpeed)
+{
+    const std::string first = cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
+    const std::string plain = cut("002", "B", "10:00:05:00 10:00:07:00", "01:00:10:00 01:00:12:00");
+    const std::string frozen = cut("002", "B", "10:00:05:00 10:00:05:01", "01:00:10:00 01:00:12:00");
+    const std::vector<std::string> rate{"--rate", "24 fps"};
+
+    const std::string inserted = Cuts(first, first + frozen).notes(rate).out;
+    const std::string freezes = Cuts(first + plain, first + frozen).notes(rate).out;
+    const std::string runs = Cuts(first + frozen, first + plain).notes(rate).out;
+
+    EXPECT_NE(inserted.find("roll B, source 10:00:05:00, freeze\n"), std::string::npos) << inserted;
+    EXPECT_NE(freezes.find("      speed 100 % now freeze             B\n"), std::string::npos) << freezes;
+    EXPECT_NE(runs.find("      freeze now speed 100 %             B\n"), std::string::npos) << runs;
+}
+
+TEST(Notes, DoubledPictureNamesItsShotsAndItsFormerVersion)
+{
+    const std::string shots = cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00") +
+                              cut("002", "VFX_0001_v001_comp", "10:00:00:00 10:00:04:00", "01:00:10:00 01:00:14:00") +
+                              cut("003", "C", "10:00:00:00 10:00:03:00", "01:00:14:00 01:00:17:00");
+    const std::string more = cut("004", "C", "10:00:00:00 10:00:03:00", "01:00:20:00 01:00:23:00") +
+                             cut("005", "A", "10:00:00:00 10:00:10:00", "01:00:23:00 01:00:33:00");
+    const std::string version = cut("004", "VFX_0001_v002_comp", "10:00:00:00 10:00:04:00", "01:00:17:00 01:00:21:00");
+    const std::vector<std::string> rate{"--rate", "24 fps", "--vfx", "VFX_****_v,_comp"};
+
+    const std::string newVersion = unbroken(Cuts(shots, shots + version).notes(rate).out);
+    const std::string oldVersion = unbroken(Cuts(shots, shots + more).notes(rate).out);
+    const std::string both =
+        unbroken(Cuts(shots, shots + cut("004", "A", "10:00:00:00 10:00:10:00", "01:00:17:00 01:00:27:00") +
+                                 cut("005", "VFX_0001_v001_comp", "10:00:00:00 10:00:04:00", "01:00:27:00 01:00:31:00"))
+                     .notes(rate)
+                     .out);
+
+    EXPECT_NE(newVersion.find("once more 00:00:04:00 VFX_0001_v002_comp stood once in the old cut at 01:00:10:00, as "
+                              "VFX_0001_v001_comp"),
+              std::string::npos)
+        << newVersion;
+    EXPECT_EQ(oldVersion.find(", as "), std::string::npos) << oldVersion;
+    EXPECT_NE(both.find("once more 00:00:14:00 A and 1 more"), std::string::npos) << both;
+    EXPECT_NE(both.find("insert 00:00:14:00 A and 1 more"), std::string::npos) << both;
+}
+
+TEST(Notes, TheHeadSaysWhatTheOffsetsAndTheFeetAre)
+{
+    const Cuts film(oldCut(), newCut());
+    const std::string offsets =
+        "The offset of a step is what the reel has gained so far; that of kept picture is how much "
+        "later it stands now than in the old cut.";
+    const std::string feet = "Feet are counted in the programme so far, from the first frame of the reel, and the last "
+                             "frame of a stretch is counted in.";
+
+    film.file(".pdf", {"--feet"});
+    for (const std::string& form :
+         {film.notes({"--feet"}).out, film.file(".html", {"--feet"}), textOfPdf(film.folder / "notes.pdf")}) {
+        EXPECT_NE(unbroken(form).find(offsets), std::string::npos) << form;
+        EXPECT_NE(unbroken(form).find(feet), std::string::npos) << form;
+    }
+    EXPECT_EQ(unbroken(film.notes().out).find(feet), std::string::npos);
+}
+
+TEST(Notes, NothingIsSaidOfStepsWhereThereAreNone)
+{
+    const std::string same = cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00") +
+                             cut("002", "A", "10:00:10:00 10:00:12:00", "01:00:10:00 01:00:12:00");
+
+    const std::string text = unbroken(Cuts(same, same).notes({"--rate", "24 fps"}).out);
+
+    EXPECT_NE(text.find("Nothing has changed."), std::string::npos) << text;
+    EXPECT_NE(text.find("1 event healed from 2"), std::string::npos) << text;
+    EXPECT_EQ(text.find("The steps are carried out"), std::string::npos) << text;
+    EXPECT_EQ(text.find("the steps above"), std::string::npos) << text;
+}
+
+TEST(Notes, TheTitlesOfTheCutsTellFilesOfOneNameApart)
+{
+    const TempFolder folder;
+    const auto written = [&](const char* version, const char* title, const std::string& cuts) {
+        std::filesystem::create_directory(folder / version);
+        return folder.write(std::string(version) + "/reel3.edl", std::string("TITLE: ") + title + "\n" + cuts);
+    };
+    const std::string shot = cut("001", "A", "10:00:00:00 10:00:10:00", "01:00:00:00 01:00:10:00");
+    const std::string nameless = "002  AX V C 10:00:00:00 10:00:02:00 01:00:10:00 01:00:12:00\n";
+    const std::string before = written("v07", "REEL 3 V07", shot + nameless);
+    const std::string after = written("v12", "REEL 3 V12", shot);
+
+    const auto notes = [&](std::vector<std::string> more) {
+        std::vector<std::string> arguments{"notes", "--old", before, "--new", after, "--rate", "24 fps"};
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        return runCadrel(arguments).out;
+    };
+    const std::string text = notes({});
+    notes({"-o", folder / "notes.html"});
+    notes({"-o", folder / "notes.json"});
+
+    EXPECT_EQ(text.find("Titles      REEL 3 V07 to REEL 3 V12\n"), 0U) << text;
+    EXPECT_NE(text.find("Old cut, reel3.edl, event 2 (AX)"), std::string::npos) << text;
+    EXPECT_NE(
+        contentOf(folder / "notes.html").find("<p class=\"titles\"><bdi>REEL 3 V07</bdi> to <bdi>REEL 3 V12</bdi></p>"),
+        std::string::npos);
+    EXPECT_EQ(json::parse(contentOf(folder / "notes.json")).at("new").at("titles"), json{"REEL 3 V12"});
+}
+
 TEST(Notes, FeetOfAMoveBetweenReelsNameBoth)
 {
     const TwoReels two;
     const ChangedPlaces one;
 
     // 20 s are 480 frames, 30 feet; 10 s more end with frame 719, 44 feet and 15 frames.
-    const std::string between = "take out 30+00 through 44+15 of reel 1, insert at 0+00 of reel 2";
+    const std::string between = "take out 30+00 through 44+15 of reel 1, put in from 0+00 of reel 2";
     two.file(".pdf", {"--feet"});
     for (const std::string& form :
          {two.notes({"--feet"}).out, two.file(".html", {"--feet"}), textOfPdf(two.folder / "notes.pdf")})
         EXPECT_NE(unbroken(form).find(between), std::string::npos) << form;
     // 10 s are 240 frames, 15 feet; 5 s more end with frame 359, 22 feet and 7 frames.
     const std::string text = one.notes({"--feet", "--rate", "24 fps"}).out;
-    EXPECT_NE(text.find("      take out 15+00 through 22+07, insert at 0+00\n"), std::string::npos) << text;
+    EXPECT_NE(text.find("      take out 15+00 through 22+07, put in from 0+00\n"), std::string::npos) << text;
 }
 
 TEST(Notes, ALengthThatDoesNotChangeHasOneBlankBeforeIt)

@@ -462,7 +462,7 @@ TEST(BadProject, AFileThatIsNoFile)
 
     expect(folder / "none.stage", "no such file; check the name and the folder");
     expect("", "no such file; check the name and the folder");
-    expect(folder / "reel", "is a folder; give the project file in it");
+    expect(folder / "reel", "is a folder without a session; give the project file in it");
     expect("/dev/zero", "is a device; give a project file");
     expect(pipe, "is a pipe; write it into a file first");
 }

@@ -2,7 +2,7 @@
 
 // The law of previews, for random projects and whatever the user does meanwhile: once the last one has ended, each of the
 // user's tracks has the bytes that it had before, and beside them what the user himself has laid there, what he has made of
-// copies, and his automation before the preview.
+// copies, and his automation.
 
 #include "host/project/Project.h"
 #include "tests/host/RandomRun.h"
@@ -142,7 +142,7 @@ private:
     }
 
     static constexpr const char* Laid = "laid ";
-    /// One that random projects have no points on.
+    /// Random projects have no points on it, nor on those with higher numbers.
     static constexpr std::int32_t UsersCurve = 8;
     /// In the place of the index of a track.
     static constexpr std::size_t OfMemos = 1000;
@@ -258,8 +258,7 @@ private:
         m_laid.push_back({entry, describe(index, name, copy->start(), copy->end())});
         RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
     }
-    /// Automation of the user's, which is the same value everywhere, between the film and the preview. In the stretch of a
-    /// preview it goes with the copies.
+    /// Automation of the user's, before a preview or in its stretch, on a curve on which nothing has been written.
     void addPoint()
     {
         const Tracks user = run.usersTracks();
@@ -273,18 +272,19 @@ private:
         const auto [index, track] = m_chance.oneOf(fitting);
         const std::string name = Laid + std::to_string(m_laid.size());
         const std::u16string entry(name.begin(), name.end());
-        const double time = 2.0 * EndOfFilm + static_cast<double>(m_laid.size());
+        const double time = Day * static_cast<double>(m_chance.below(3)) + 2.0 * EndOfFilm +
+                            static_cast<double>(m_chance.below(2000)) + static_cast<double>(m_laid.size()) / 64.0;
         const auto point = makeCounted<standin::AutomationPoint>();
         point->setName(entry);
         point->setSpan(time, time);
         point->setValue(0.75);
         standin::EditService& edits = run.application.edits();
         RC_ASSERT(edits.begin(true) == ResultOk);
-        point->insertInto(track->curve(UsersCurve));
+        point->insertInto(track->curve(UsersCurve + static_cast<std::int32_t>(m_laid.size())));
         RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
         m_laid.push_back({entry, describe(index, name, time, 0.75)});
     }
-    /// Moves the points of the user's from a stored track to what is laid; there are no others on his curve.
+    /// Moves the points of the user's from a stored track to what is laid; there are no others on his curves.
     static void takePoints(std::size_t track, json& stored, std::multiset<std::string>& laid)
     {
         const auto curves = stored.find("curves");
@@ -292,7 +292,7 @@ private:
             return;
         json others = json::array();
         for (const json& curve : *curves) {
-            if (curve["number"] != UsersCurve) {
+            if (curve["number"] < UsersCurve) {
                 others.push_back(curve);
                 continue;
             }

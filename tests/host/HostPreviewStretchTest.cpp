@@ -14,6 +14,7 @@
 #include "tests/support/ThrownResult.h"
 #include "tests/support/host/WatchedProgress.h"
 #include "velmark/Attributes.h"
+#include "velmark/Automation.h"
 #include "velmark/ClassId.h"
 
 #include <gtest/gtest.h>
@@ -205,6 +206,51 @@ TEST_P(HostPreviewStretchTest, LeavesOtherTracksAsTheyAre)
     EXPECT_EQ(host.contentOf(track), film);
 }
 
+TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidOnTopOfOneAnotherInItsOrder)
+{
+    previewAll();
+    // The preview's stretch begins with the day, an hour before the film in it.
+    host.addSound(track, u"below", Day - 3605.0, Day - 3599.0);
+    host.addSound(track, u"above", Day - 3605.0, Day - 3602.0);
+    host.addSound(track, u"within", Day + 1.0, Day + 2.0);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(host.contentOf(track),
+              (Texts{"one 0-10", "two 10-20", "below 82795-82801", "above 82795-82798", "within 86401-86402"}));
+}
+
+TEST_P(HostPreviewStretchTest, LeavesTheAutomationThatTheUserDrawsOnACurveOnWhichItHasWrittenNothing)
+{
+    using Curve = standin::Envelope::Curve;
+    using Points = std::vector<std::pair<double, float>>;
+    const auto pointsOf = [&](int32 number) {
+        Points points;
+        for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, number)))
+            points.emplace_back(point->getStart(nullptr), query<IAutomationPoint>(point)->getValue());
+        return points;
+    };
+    host.addPoint(track, Curve::Volume, host.inHost(5.0), 0.5F);
+    host.addPoint(track, Curve::Volume, host.inHost(7.0), 0.25F);
+    const Points before = pointsOf(Curve::Volume);
+    for (const auto& [number, isReopened] : {std::pair(Curve::Pan, false), std::pair(Curve::Mute, true)}) {
+        SCOPED_TRACE(number);
+        previewAll();
+        ASSERT_GT(pointsOf(Curve::Volume).size(), before.size());
+        const double offset = previewOffset() - host.origin;
+        host.addPoint(track, number, offset + 3603.0, 0.25F);
+        host.addPoint(track, number, offset + 3630.0, 0.75F);
+        const Points drawn = pointsOf(number);
+        if (isReopened)
+            reopen();
+
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(pointsOf(number), drawn);
+        EXPECT_EQ(pointsOf(Curve::Volume), before);
+    }
+}
+
 TEST_P(HostPreviewStretchTest, GivesWayToWhatTheUserHasLaidSinceThePreviewBefore)
 {
     adapter().setPreviewActive(true);
@@ -304,8 +350,13 @@ TEST_P(HostPreviewStretchTest, LeavesNoPointOfItsOwnWhoseValueIsRounded)
     }
 
     host.conform();
-    for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, volume)))
-        EXPECT_LT(point->getStart(nullptr), Day - host.origin);
+    // The curve falls by 0.2 in a second.
+    const auto left = standin::tests::childrenOf(*host.curveOf(track, volume));
+    ASSERT_EQ(left.size(), 2U);
+    EXPECT_NEAR(left[0]->getStart(nullptr), host.inHost(10.0), 1e-9);
+    EXPECT_NEAR(query<IAutomationPoint>(left[0])->getValue(), 0.436, 1e-6);
+    EXPECT_NEAR(left[1]->getStart(nullptr), host.inHost(11.04), 1e-9);
+    EXPECT_NEAR(query<IAutomationPoint>(left[1])->getValue(), 0.228, 1e-6);
     adapter().setPreviewActive(true);
     EXPECT_EQ(previewOffset(), Day);
 }
@@ -468,6 +519,29 @@ TEST_P(HostPreviewStretchTest, TakesAwayNothingOfTheFilmForARecordThatIsDamaged)
     }
 }
 
+TEST_P(HostPreviewStretchTest, LeavesCopiesOfAMediumThatWasRelinkedUnlessItIsTakenBack)
+{
+    auto& medium = host.addMedia(u"/sound/take 1.wav", 60.0);
+    auto& moved = host.addMedia(u"/other disk/take 1.wav", 60.0);
+    const auto link = [&](standin::MediaClip& clip) {
+        for (const Node& event : standin::tests::childrenOf(*track)) {
+            if (event->getName() == std::u16string(u"one"))
+                dynamic_cast<standin::ClipEvent&>(*event).setClip(Counted<standin::MediaClip>::share(&clip));
+        }
+    };
+    link(medium);
+    previewAll();
+    link(moved);
+
+    adapter().setPreviewActive(false);
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20", "one 86410-86420"}));
+
+    ASSERT_TRUE(host.undo());
+    link(medium);
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+    EXPECT_EQ(host.contentOf(track), film);
+}
+
 // The preview of another project from which a track was imported.
 
 TEST_P(HostPreviewStretchTest, LetsMemosFollowWhateverATrackAboveTheirsKeepsOfAnotherPreview)
@@ -510,6 +584,45 @@ TEST_P(HostPreviewStretchTest, LeavesTheAutomationOfTheFilmWhereATrackKeepsAReco
     for (const Node& point : standin::tests::childrenOf(*host.curveOf(other, volume)))
         points.push_back(point->getStart(nullptr));
     EXPECT_EQ(points, (std::vector<double>{host.inHost(3.0), host.inHost(15.0)}));
+}
+
+TEST_P(HostPreviewStretchTest, BendsNoCurveWhereAnotherTrackKeepsAnEarlierRecordOfAnotherPreview)
+{
+    constexpr int32 volume = standin::Envelope::Curve::Volume;
+    const Node other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addPoint(other, volume, host.inHost(3.0), 0.25F);
+    host.addPoint(other, volume, host.inHost(15.0), 0.75F);
+    host.addPoint(other, volume, host.inHost(6000.0), 0.5F);
+    const auto points = [&] {
+        Texts found;
+        for (const Node& point : standin::tests::childrenOf(*host.curveOf(other, volume))) {
+            const double time = point->getStart(nullptr) - host.inHost(0.0);
+            if (time < Day - 1.0)
+                found.push_back(std::to_string(time) + " " +
+                                std::to_string(query<IAutomationPoint>(point)->getValue()));
+        }
+        return found;
+    };
+    const Texts before = points();
+    ASSERT_EQ(before.size(), 3U);
+    for (const double recordStart : {12.0, 5000.0}) {
+        SCOPED_TRACE(recordStart);
+        previewAll();
+        // After the copies the user lets the curve go on at another value.
+        const Node last = standin::tests::childrenOf(*host.curveOf(other, volume)).back();
+        host.edit(u"Automation", [&] { requireOk(query<IAutomationPoint>(last)->setValue(0.125F)); });
+        host.addPoint(other, volume, Day + host.inHost(100.0), 0.125F);
+        const Node imported = host.addTrack(TypeWord::Audio, u"Imported");
+        const double start = host.inHost(recordStart);
+        host.edit(u"Import", [&] {
+            writeNumbers(host.context(), *imported, AttributeKey::Preview, {start, start + 1.0});
+        });
+
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(points(), before);
+        EXPECT_EQ(host.contentOf(track), film);
+    }
 }
 
 // Memos.

@@ -599,6 +599,48 @@ TEST_P(HostPreviewTest, GoesBackToWhenItWasOffAlsoWhereTheFirstRequestWasRefused
     EXPECT_FALSE(adapter().isPreviewActive());
 }
 
+TEST_P(HostPreviewTest, GoesBackToWhenItWasOffAlsoWhereItWasRequestedTwice)
+{
+    const Span cycle = transportCycle();
+    const Span left = locators();
+    adapter().setPreviewActive(true);
+    ASSERT_EQ(adapter().startPreview(firstChange(), 0, 0, 1), Result::Ok);
+    host.preview(changes());
+    ASSERT_EQ(host.undoNames(), entriesBeforeAnd({u"Preview"}));
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_FALSE(adapter().isPreviewActive());
+    EXPECT_EQ(transportCycle(), cycle);
+    EXPECT_EQ(locators(), left);
+}
+
+TEST_P(HostPreviewTest, GoesBackToWhenItWasOffAlsoWhereTheFirstBecameNoEntry)
+{
+    adapter().setPreviewActive(true);
+    standin::EditService& edits = host.application.edits();
+    ASSERT_EQ(edits.begin(true), ResultOk);
+    host.preview(firstChange());
+    ASSERT_EQ(edits.commit(host.document(), u"Other edit"), ResultOk);
+    ASSERT_NE(host.undoNames().back(), u"Preview");
+    host.preview(changes());
+    ASSERT_EQ(host.undoNames().back(), u"Preview");
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_FALSE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, GoesBackToThePreviewBeforeOnceThatIsAnEntry)
+{
+    previewAll();
+    host.preview(firstChange());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_TRUE(adapter().isPreviewActive());
+}
+
 TEST_P(HostPreviewTest, KeepsWhatItCanOfHowEverythingStood)
 {
     // From a preview before, which stood elsewhere.

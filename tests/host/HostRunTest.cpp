@@ -4,10 +4,12 @@
 
 #include "core/cut/Cut.h"
 #include "core/notify/ChangeContext.h"
+#include "core/protect/RunRecord.h"
 #include "host/Host.h"
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
+#include "standin/project/AutomationPoint.h"
 #include "standin/project/Track.h"
 #include "standin/services/IdleManager.h"
 #include "tests/support/core/RecordingListener.h"
@@ -21,6 +23,8 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <functional>
+#include <limits>
 #include <string>
 #include <utility>
 #include <vector>
@@ -94,6 +98,20 @@ public:
     int32 addHandler(IActionHandler*) override { return ResultFalse; }
     int32 removeHandler(IActionHandler*) override { return ResultFalse; }
     int32 invoke(const char*, const char*, int32) override { return ResultFalse; }
+};
+
+/// Alerts whose user does something before he goes on.
+class WatchedAlerts : public Implements<WatchedAlerts, FObject, IAlertService> {
+public:
+    static constexpr const char* ClassName = "WatchedAlerts";
+
+    std::function<void()> whenShown;
+
+    int32 show(const char16_t*, const char16_t*, const char16_t*, const char16_t*) override
+    {
+        whenShown();
+        return 1;
+    }
 };
 
 /// A film of two clips of ten seconds that change places.
@@ -197,6 +215,80 @@ TEST_P(HostRunTest, CanBeMadeAgain)
     // Changed places twice.
     EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
     EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel", u"Apply Cadrel"}));
+}
+
+TEST_P(HostRunTest, IsNotedInTheModelAndItsUndoTakesTheNoteBack)
+{
+    host.conform();
+    const auto isDone = [this] {
+        const auto noted = core::RunRecord::find(host.model());
+        return noted && noted->haveCarriedOut(host.model().changeEdl(), true);
+    };
+
+    EXPECT_TRUE(isDone());
+    ASSERT_TRUE(host.undo());
+    EXPECT_FALSE(isDone());
+    ASSERT_TRUE(host.redo());
+    EXPECT_TRUE(isDone());
+}
+
+TEST_P(HostRunTest, IsNotedForWhatTheUserLetsChangeAndNotForTheBoundsOfItsRequest)
+{
+    host.settings().setRestrictRange(true);
+    host.settings().setPreserveMaterial(AdaptedHost::onClock(0.0), AdaptedHost::onClock(12.0));
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(5.0), AdaptedHost::onClock(10.0)}), Result::Ok);
+    host.idle();
+
+    const auto noted = core::RunRecord::find(host.model());
+    ASSERT_TRUE(noted);
+    const auto isDoneFrom = [&](double start, double end) {
+        const core::FrameRange range{static_cast<std::int32_t>(25 * AdaptedHost::onClock(start)),
+                                     static_cast<std::int32_t>(25 * AdaptedHost::onClock(end))};
+        return noted->haveCarriedOut(host.model().changeEdl(), true, range);
+    };
+    EXPECT_TRUE(isDoneFrom(0.0, 5.0));
+    EXPECT_TRUE(isDoneFrom(11.0, 12.0));
+    EXPECT_FALSE(isDoneFrom(12.0, 20.0));
+}
+
+TEST_P(HostRunTest, IsNotNotedWhenItFails)
+{
+    requestRun();
+    host.altered.hide(ClassId::ObjectList);
+    host.idle();
+
+    ASSERT_EQ(heard.results, Results{Result::HostObjectMissing});
+    EXPECT_FALSE(core::RunRecord::find(host.model()));
+}
+
+TEST_P(HostRunTest, IsNotNotedWhenTheUserCancelsIt)
+{
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (host.isEditOpen())
+            progress->cancel();
+    };
+    host.conform();
+
+    ASSERT_EQ(heard.results, Results{Result::Cancelled});
+    EXPECT_FALSE(core::RunRecord::find(host.model()));
+}
+
+TEST_P(HostRunTest, ANoteThatCannotBeReadDoesNotKeepItFromBeingDone)
+{
+    host.model().setProperty(core::PropertyKey::DoneRuns, core::Variant("no bytes of runs"));
+    host.conform();
+
+    EXPECT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_TRUE(core::RunRecord::find(host.model()));
+}
+
+TEST_P(HostRunTest, APreviewIsNoRun)
+{
+    host.preview(host.model().changeEdl());
+
+    ASSERT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_FALSE(core::RunRecord::find(host.model()));
 }
 
 //     film           0         10         20         30
@@ -411,6 +503,27 @@ TEST_P(HostRunTest, TellsWhatStandsOnTheTracksThatItChanges)
     EXPECT_EQ(material(), Material());
 }
 
+TEST_P(HostRunTest, TellsOfEveryKindOfThingThatARunTakesAway)
+{
+    host.addPart(track, u"part", host.inHost(30.0), host.inHost(35.0));
+    const auto picture = host.addTrack(TypeWord::Video, u"VIDEO");
+    host.addClip(picture, u"shot", host.inHost(40.0), host.inHost(45.0));
+    const auto markers = host.addTrack(TypeWord::Marker, u"Notes");
+    host.addPointMarker(markers, u"note", host.inHost(50.0));
+    host.addRangeMarker(markers, u"scene", host.inHost(52.0), host.inHost(58.0));
+    host.addPoint(track, standin::Envelope::Curve::Volume, host.inHost(60.0), 0.5F);
+
+    auto material = host.adapter().getMaterial();
+    std::ranges::sort(material, {}, &core::SecondsRange::start);
+    ASSERT_EQ(material.size(), 7U);
+    const std::vector<std::pair<double, double>> expected{{0, 10},  {10, 20}, {30, 35}, {40, 45},
+                                                          {50, 50}, {52, 58}, {60, 60}};
+    for (std::size_t index = 0; index < expected.size(); ++index) {
+        EXPECT_DOUBLE_EQ(material[index].start, AdaptedHost::onClock(expected[index].first)) << index;
+        EXPECT_DOUBLE_EQ(material[index].end, AdaptedHost::onClock(expected[index].second)) << index;
+    }
+}
+
 TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
 {
     // The second half of the film goes far behind its end, and no event makes the project end there.
@@ -424,9 +537,150 @@ TEST_P(HostRunTest, LeavesNoAutomationBehindInThePreview)
 
     host.conform();
 
-    for (const AdaptedHost::Node& point :
-         standin::tests::childrenOf(*host.curveOf(track, standin::Envelope::Curve::Volume)))
-        EXPECT_LT(point->getStart(nullptr), host.inHost(20.0));
+    // What is carried over runs as what was there, on into what stays.
+    const auto points = standin::tests::childrenOf(*host.curveOf(track, standin::Envelope::Curve::Volume));
+    ASSERT_EQ(points.size(), 2U);
+    EXPECT_EQ(points[0]->getStart(nullptr), host.inHost(2.0));
+    EXPECT_EQ(query<IAutomationPoint>(points[0])->getValue(), 0.25F);
+    EXPECT_EQ(points[1]->getStart(nullptr), host.inHost(18.0));
+    EXPECT_EQ(query<IAutomationPoint>(points[1])->getValue(), 0.75F);
+}
+
+TEST(HostRunRange, LosesNothingWhereItsBoundsReachPastTheDayThatTimecodesName)
+{
+    for (const double after : {86400.0, 86400.04, 86486.36, std::numeric_limits<double>::infinity()}) {
+        SCOPED_TRACE(after);
+        AdaptedHost host(0.0);
+        const auto track = host.addTrack(TypeWord::Audio, u"DX");
+        host.addClip(track, u"one", 0.0, 10.0);
+        host.addClip(track, u"two", 10.0, 20.0);
+        host.switchMarkersOff();
+        host.carryOver("00:00:00:00", "00:00:10:00", "00:00:10:00", "00:00:20:00");
+        host.carryOver("00:00:10:00", "00:00:20:00", "00:00:00:00", "00:00:10:00");
+        host.settings().setRestrictRange(true);
+        host.settings().setPreserveMaterial(0.0, after);
+
+        host.conform();
+
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+        // This film stands an hour before the others.
+        EXPECT_EQ(host.contentOf(track), (Texts{"two -3600--3590", "one -3590--3580"}));
+    }
+}
+
+TEST_P(HostRunTest, ReplacesNothingBetweenBoundsThatAreNoNumbersOrTheWrongWayRound)
+{
+    constexpr double Infinity = std::numeric_limits<double>::infinity();
+    constexpr double NoNumber = std::numeric_limits<double>::quiet_NaN();
+    host.settings().setRestrictRange(true);
+    for (const auto& [before, after] : {std::pair(0.0, NoNumber), std::pair(NoNumber, 86400.0), std::pair(86400.0, 0.0),
+                                        std::pair(Infinity, Infinity), std::pair(-Infinity, -Infinity)}) {
+        SCOPED_TRACE(std::to_string(before) + " to " + std::to_string(after));
+        host.settings().set(&core::Settings::preserveMaterialBefore, before);
+        host.settings().set(&core::Settings::preserveMaterialAfter, after);
+
+        host.conform();
+
+        EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+        EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+    }
+}
+
+TEST(HostRunRange, LeavesNothingBehindThatWouldStandPastTheDayThatTimecodesName)
+{
+    AdaptedHost host(86340.0);
+    const auto track = host.addTrack(TypeWord::Audio, u"DX");
+    host.addClip(track, u"one", 0.0, 30.0);
+    host.switchMarkersOff();
+    // Ten seconds of the source come after the end of the day.
+    host.carryOver("23:59:00:00", "23:59:20:00", "23:59:50:00", "23:59:59:24");
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    // The clock begins 82740 s after the other films.
+    EXPECT_EQ(host.contentOf(track), (Texts{"one 82790-82800"}));
+    EXPECT_NE(track->hasAttribute(AttributeKey::Preview), ResultOk);
+    EXPECT_NE(track->hasAttribute(AttributeKey::PreviewEvents), ResultOk);
+}
+
+TEST_P(HostRunTest, AddsNoPointsToTheCurvesThatCountAsTheUsers)
+{
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    using Points = std::vector<std::pair<double, float>>;
+    const auto set = [this](const Points& points) {
+        Points inHost;
+        for (const auto& [time, value] : points)
+            inHost.emplace_back(host.inHost(time), value);
+        return inHost;
+    };
+    const Points before = set({{2.0, 0.5F}, {5.0, 0.8F}, {18.0, 0.8F}, {19.0, 0.0F}});
+    for (const auto& [time, value] : before)
+        host.addPoint(track, volume, time, value);
+    // The host knows which ones it has put at the edges of what was copied.
+    const auto users = [&] {
+        Points found;
+        for (const AdaptedHost::Node& child : standin::tests::childrenOf(*host.curveOf(track, volume))) {
+            auto& point = dynamic_cast<standin::AutomationPoint&>(*child);
+            if (!point.isHolding())
+                found.emplace_back(point.start(), point.getValue());
+        }
+        return found;
+    };
+
+    for (int round = 0; round < 3; ++round) {
+        host.conform();
+        EXPECT_EQ(users(), set({{8.0, 0.8F}, {9.0, 0.0F}, {12.0, 0.5F}, {15.0, 0.8F}}));
+        host.conform();
+        EXPECT_EQ(users(), before);
+    }
+}
+
+TEST_P(HostRunTest, StoresTheUsersBoundsWhenItIsSavedWhileARunWithinOthersGoesOn)
+{
+    host.settings().setPreserveMaterial(3.0, 4.0);
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (progress->calls.back().find("Event: 1") != std::string::npos)
+            host.project.announceStoring();
+    };
+    ASSERT_EQ(host.adapter().startCadrelWithin({host.onClock(0.0), host.onClock(20.0)}), Result::Ok);
+
+    host.idle();
+    host.adapter().removeListener(&heard);
+    host.disconnect();
+    host.connect();
+
+    EXPECT_FALSE(host.settings().restrictRange());
+    EXPECT_EQ(host.settings().preserveMaterialBefore(), 3.0);
+    EXPECT_EQ(host.settings().preserveMaterialAfter(), 4.0);
+}
+
+TEST_P(HostRunTest, MakesTheMemosAnewThatTheUserRemovesWhileItsAlertIsUp)
+{
+    host.model().videoList().add(
+        core::VideoList::Entry("/picture/reel3_v12.mov", core::Timecode("01:00:00:00"), core::Timecode("00:00:20:00")),
+        false);
+    host.project.setTimeOrigin(3606.0);
+    host.idle();
+    const auto alerts = makeCounted<WatchedAlerts>();
+    int shown = 0;
+    alerts->whenShown = [&] {
+        if (++shown > 1)
+            return;
+        const AdaptedHost::Node memos = host.trackNamed(u"Memos");
+        host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(memos->getParent(), memos.get())); });
+    };
+    host.altered.unhide(IAlertService::iid);
+    host.altered.replace(IAlertService::iid, alerts);
+    host.conform();
+    ASSERT_GE(shown, 1);
+    ASSERT_FALSE(host.trackNamed(u"Memos"));
+
+    host.conform();
+
+    EXPECT_EQ(heard.results, (Results{Result::Ok, Result::Ok}));
+    EXPECT_TRUE(host.trackNamed(u"Memos"));
 }
 
 TEST_P(HostRunTest, LeavesOutWhatHasNoTimecodes)
@@ -780,7 +1034,7 @@ TEST_P(HostRunTest, DoesNothingMoreOnceItIsCancelled)
 
     ASSERT_TRUE(host.redo());
 
-    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel (incomplete)");
     EXPECT_FALSE(host.trackNamed(u"New Video")) << "The first event was carried over, and that was all.";
 }
 
@@ -995,8 +1249,7 @@ TEST_P(HostRunTest, TellsThatItIsIncompleteWhereTheHostRefusesToTakeItBack)
 
     host.idle();
 
-    // The name was given before.
-    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
     EXPECT_EQ(heard.results, Results{Result::HostCallFailed});
     EXPECT_FALSE(host.isEditOpen());
     EXPECT_FALSE(host.application.idleManager().isBlocked());

@@ -31,6 +31,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 #include <optional>
@@ -90,9 +91,25 @@ public:
 
     void conform()
     {
+        const std::size_t entryCount = project.undoList().doneCount();
         RC_ASSERT(adapter->startCadrel() == Result::Ok);
         application.idle();
-        RC_ASSERT(isLastEntry(u"Apply Cadrel"));
+        RC_ASSERT(project.undoList().doneCount() == entryCount + 1);
+        RC_ASSERT(project.undoList().nameAt(entryCount) == std::u16string(u"Apply Cadrel"));
+    }
+
+    /// Lets the clock begin earlier, so that all material stands elsewhere in it.
+    void moveOrigin()
+    {
+        const double by = static_cast<double>(m_chance.below(100));
+        if (by > project.timeOrigin())
+            return;
+        project.setTimeOrigin(project.timeOrigin() - by);
+        application.idle();
+        for (Carried& carried : changes) {
+            carried.source += by;
+            carried.destination += by;
+        }
     }
 
     /// Lets clips come along that hang over, also where there is no room for them at the begin of the clock.

@@ -71,7 +71,12 @@ struct ModuleFunctions {
 /// A host with a screen, in plain Xlib, which may load the module.
 class LoadedModule : public testing::Test, protected HostLoop {
 protected:
-    LoadedModule() { m_application.views().setWindowSystem(&m_windows); }
+    /// With `videos`, the host opens video files.
+    explicit LoadedModule(standin::VideoSupport* videos = nullptr)
+        : m_application(standin::Terminal(m_messages, false), videos)
+    {
+        m_application.views().setWindowSystem(&m_windows);
+    }
     ~LoadedModule() override { m_application.views().setWindowSystem(nullptr); }
 
     /// The module gets this context or, with null, the application's.
@@ -112,7 +117,7 @@ private:
 protected:
     VirtualScreen m_screen;
     XWindows m_windows;
-    standin::Application m_application{standin::Terminal(m_messages, false)};
+    standin::Application m_application;
     std::unique_ptr<standin::ModuleLoader> m_module;
 };
 

@@ -4,6 +4,7 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
+#include "core/edl/StableSort.h"
 #include "util/Result.h"
 
 #include <algorithm>
@@ -17,12 +18,15 @@ namespace {
 
 using WeakEvents = std::vector<std::weak_ptr<EventBase>>;
 
-/// Sorts a list that is mostly in order already. Equal elements keep their order.
-template <typename Range, typename Less>
-void sortStably(Range& range, Less less)
+std::vector<std::shared_ptr<EventBase>> timedOf(const EventList& events)
 {
-    if (!std::is_sorted(range.begin(), range.end(), less))
-        std::stable_sort(range.begin(), range.end(), less);
+    std::vector<std::shared_ptr<EventBase>> timed;
+    timed.reserve(events.size());
+    for (const auto& event : events.events()) {
+        if (!event->hasFlaw(EventFlaw::TimecodeInvalid))
+            timed.push_back(event);
+    }
+    return timed;
 }
 
 std::vector<CutEntry> entriesSortedBy(const std::vector<std::shared_ptr<EventBase>>& events,
@@ -40,6 +44,13 @@ std::vector<CutEntry> entriesSortedBy(const std::vector<std::shared_ptr<EventBas
     for (const std::uint32_t index : order)
         entries.push_back({(events[index].get()->*timeOf)(), events[index]});
     return entries;
+}
+
+WeakEvents eventsInRange(const EventEdges& edges, double start, double end)
+{
+    WeakEvents events;
+    edges.forEachInRange(start, end, [&](const std::shared_ptr<EventBase>& event) { events.emplace_back(event); });
+    return events;
 }
 
 bool isInside(double time, const SecondsRange& range)
@@ -93,27 +104,12 @@ std::vector<SecondsRange> uncoveredRanges(const SecondsRange& range, const WeakE
 } // namespace
 
 CutMap::CutMap(const EventList& events, const Framerate& framerate)
+    : m_held(timedOf(events)), m_source(m_held, &EventBase::srcIn, &EventBase::srcOut, framerate),
+      m_destination(m_held, &EventBase::dstIn, &EventBase::dstOut, framerate)
 {
-    m_held.reserve(events.size());
-    for (const auto& event : events.events()) {
-        if (!event->hasFlaw(EventFlaw::TimecodeInvalid))
-            m_held.push_back(event);
-    }
-
-    m_sourceEdges.reserve(2 * m_held.size());
-    m_destinationEdges.reserve(2 * m_held.size());
     m_heldByAddress.reserve(m_held.size());
-    for (std::uint32_t index = 0; index < m_held.size(); ++index) {
-        const EventBase& event = *m_held[index];
-        m_sourceEdges.push_back({event.srcIn().toSeconds(framerate), index});
-        m_sourceEdges.push_back({event.srcOut().toSeconds(framerate), index});
-        m_destinationEdges.push_back({event.dstIn().toSeconds(framerate), index});
-        m_destinationEdges.push_back({event.dstOut().toSeconds(framerate), index});
-        m_heldByAddress.push_back(&event);
-    }
-    const auto isEarlier = [](const Edge& a, const Edge& b) { return a.seconds < b.seconds; };
-    sortStably(m_sourceEdges, isEarlier);
-    sortStably(m_destinationEdges, isEarlier);
+    for (const auto& event : m_held)
+        m_heldByAddress.push_back(event.get());
     std::sort(m_heldByAddress.begin(), m_heldByAddress.end(), std::less<>());
 
     m_byDstIn = entriesSortedBy(m_held, &EventBase::dstIn);
@@ -125,46 +121,14 @@ bool CutMap::contains(const std::shared_ptr<EventBase>& event) const
     return std::binary_search(m_heldByAddress.begin(), m_heldByAddress.end(), event.get(), std::less<>());
 }
 
-SecondsRange CutMap::span(const std::vector<Edge>& edges)
-{
-    if (edges.empty())
-        return {};
-    if (edges.front().seconds > edges.back().seconds)
-        throw Result::InvalidArgument;
-    return {edges.front().seconds, edges.back().seconds};
-}
-
 WeakEvents CutMap::eventsInSourceRange(double start, double end) const
 {
-    return eventsInRange(m_sourceEdges, start, end);
+    return eventsInRange(m_source, start, end);
 }
 
 WeakEvents CutMap::eventsInDestinationRange(double start, double end) const
 {
-    return eventsInRange(m_destinationEdges, start, end);
-}
-
-WeakEvents CutMap::eventsInRange(const std::vector<Edge>& edges, double start, double end) const
-{
-    if (!(start < end))
-        return {};
-    const auto first =
-        std::partition_point(edges.begin(), edges.end(), [&](const Edge& edge) { return edge.seconds < start; });
-    const auto behind = std::partition_point(first, edges.end(), [&](const Edge& edge) { return edge.seconds <= end; });
-
-    WeakEvents events;
-    if (first != behind) {
-        for (auto edge = first; edge != behind; ++edge) {
-            const bool isRepeated = edge != first && m_held[edge->index] == m_held[std::prev(edge)->index];
-            if (!isRepeated)
-                events.push_back(m_held[edge->index]);
-        }
-    } else if (first != edges.begin() && behind != edges.end()) {
-        const auto& before = m_held[std::prev(first)->index];
-        if (before == m_held[behind->index])
-            events.push_back(before);
-    }
-    return events;
+    return eventsInRange(m_destination, start, end);
 }
 
 std::vector<SecondsRange> CutMap::uncoveredSourceRanges(const SecondsRange& range) const

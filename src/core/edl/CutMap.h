@@ -2,12 +2,11 @@
 
 #pragma once
 
+#include "core/edl/EventEdges.h"
 #include "core/time/Framerate.h"
 #include "core/time/SecondsRange.h"
 #include "core/time/Timecode.h"
 
-#include <cstddef>
-#include <cstdint>
 #include <memory>
 #include <vector>
 
@@ -30,6 +29,8 @@ class CutMap {
 public:
     /// Throws what Timecode::toSeconds throws under `framerate`.
     CutMap(const EventList& events, const Framerate& framerate);
+    CutMap(const CutMap&) = delete;
+    CutMap& operator=(const CutMap&) = delete;
 
     /// Sorted by DST IN; equal times in the list's order.
     const std::vector<CutEntry>& dstInOrder() const { return m_byDstIn; }
@@ -39,8 +40,8 @@ public:
     bool contains(const std::shared_ptr<EventBase>& event) const;
 
     /// From the first to the last edge, in seconds; 0 to 0 for an empty map.
-    SecondsRange sourceSpan() const { return span(m_sourceEdges); }
-    SecondsRange destinationSpan() const { return span(m_destinationEdges); }
+    SecondsRange sourceSpan() const { return m_source.span(); }
+    SecondsRange destinationSpan() const { return m_destination.span(); }
 
     /// The events with an edge from `start` to `end` seconds, both included, in the order of the edges; if another
     /// event's edge is between the two edges of an event, that event is in the result twice. If no edge is in the
@@ -58,19 +59,11 @@ public:
     bool isDestinationRangeInsideAnEvent(const SecondsRange& range) const;
 
 private:
-    struct Edge {
-        double seconds;
-        std::uint32_t index; ///< of the event in `m_held`
-    };
-
-    static SecondsRange span(const std::vector<Edge>& edges);
-    std::vector<std::weak_ptr<EventBase>> eventsInRange(const std::vector<Edge>& edges, double start, double end) const;
-
-    std::vector<Edge> m_sourceEdges;
-    std::vector<Edge> m_destinationEdges;
+    std::vector<std::shared_ptr<EventBase>> m_held; ///< in the list's order
+    EventEdges m_source;
+    EventEdges m_destination;
     std::vector<CutEntry> m_byDstIn;
     std::vector<CutEntry> m_bySrcIn;
-    std::vector<std::shared_ptr<EventBase>> m_held; ///< in the list's order
     std::vector<const EventBase*> m_heldByAddress;
 };
 

@@ -3,8 +3,7 @@
 #include "core/edl/ProgrammeOrder.h"
 
 #include "core/edl/EventBase.h"
-
-#include <algorithm>
+#include "core/edl/StableSort.h"
 
 namespace cadrel::core {
 
@@ -20,10 +19,7 @@ std::vector<PlacedEvent> inProgrammeOrder(const std::vector<std::shared_ptr<Even
         ordered.push_back({index, event.srcIn().toFrameCount(framerate), event.srcOut().toFrameCount(framerate),
                            event.dstIn().toFrameCount(framerate), event.dstOut().toFrameCount(framerate)});
     }
-    const auto isEarlier = [](const PlacedEvent& a, const PlacedEvent& b) { return a.dstIn < b.dstIn; };
-    // Mostly they are in order already.
-    if (!std::is_sorted(ordered.begin(), ordered.end(), isEarlier))
-        std::stable_sort(ordered.begin(), ordered.end(), isEarlier);
+    sortStably(ordered, [](const PlacedEvent& a, const PlacedEvent& b) { return a.dstIn < b.dstIn; });
     return ordered;
 }
 

@@ -119,10 +119,11 @@ private:
 };
 
 BlackCarrying::BlackCarrying(const FrameRanges& oldLit, const FrameRanges& newLit, const Reels& reels,
-                             const FrameRanges& material, const Framerate& framerate, CarriedStretches& carried)
-    : m_oldLit(oldLit), m_newLit(newLit), m_reels(reels),
-      m_allMaterial(without(material, oldLit)), m_day{0, framerate.lastFrame}, m_partingGap(partingGap(framerate)),
-      m_carried(carried)
+                             const std::vector<FrameRange>& material, const Framerate& framerate,
+                             CarriedStretches& carried)
+    : m_oldLit(oldLit), m_newLit(newLit), m_reels(reels), m_pieces(material),
+      m_allMaterial(without(united(material), oldLit)), m_day{0, framerate.lastFrame},
+      m_partingGap(partingGap(framerate)), m_carried(carried)
 {
     m_material = within(m_day, m_allMaterial);
 }
@@ -206,17 +207,26 @@ void BlackCarrying::carryBetween(const Gap& gap, const FrameRanges& picture)
         carry(gap.frames, *best, AllTime);
 }
 
+// What goes along with a reel has its place first, then what stays, and last the clips that span.
 void BlackCarrying::carryAroundReels()
 {
-    std::vector<FrameRange> staying;
-    for (const Surroundings& around : surroundings()) {
-        for (const FrameRange& block : joinedWithin(m_partingGap, within(around.oldFrames, m_allMaterial))) {
-            if (!carryAttached(around, block))
-                staying.push_back(block);
-        }
+    const std::vector<Surroundings> all = surroundings();
+    std::vector<ReelGap::Parts> parts;
+    for (const Surroundings& around : all) {
+        parts.push_back(around.parts());
+        follow(parts.back().withEnd, around.shiftBefore(), around.newFrames);
+        follow(parts.back().withStart, around.shiftAfter(), around.newFrames);
     }
-    for (const FrameRange& block : staying)
-        carry(block, 0, AllTime);
+    for (const ReelGap::Parts& part : parts) {
+        for (const FrameRange& block : part.staying)
+            carry(block, 0, AllTime);
+    }
+    for (std::size_t index = 0; index < all.size(); ++index) {
+        follow(parts[index].spanningWithEnd, all[index].shiftBefore(), all[index].newFrames);
+        follow(parts[index].spanningWithStart, all[index].shiftAfter(), all[index].newFrames);
+        for (const FrameRange& range : parts[index].spanningStaying)
+            carry(range, 0, AllTime);
+    }
 }
 
 void BlackCarrying::carryAsChanged(const std::vector<ChangeStretch>& changes)
@@ -235,41 +245,30 @@ std::vector<BlackCarrying::Surroundings> BlackCarrying::surroundings() const
 {
     const FrameRanges oldGaps = without({AllTime}, m_reels.ofOld());
     const FrameRanges newGaps = without({AllTime}, m_reels.ofNew());
+    const std::vector<ReelPair>& pairs = m_reels.pairs();
     std::vector<Surroundings> all;
     for (std::size_t index = 0; index < oldGaps.size(); ++index) {
-        Surroundings around{oldGaps[index], AllTime, nullptr, nullptr};
-        if (m_reels.canBePaired()) {
-            around.newFrames = newGaps[index];
-            around.before = index > 0 ? &m_reels.pairs()[index - 1] : nullptr;
-            around.after = index < m_reels.pairs().size() ? &m_reels.pairs()[index] : nullptr;
-        }
-        all.push_back(around);
+        const ReelPair* const before = index > 0 && index <= pairs.size() ? &pairs[index - 1] : nullptr;
+        const ReelPair* const after = index < pairs.size() ? &pairs[index] : nullptr;
+        const ReelGap gap(oldGaps[index], before != nullptr, after != nullptr, m_partingGap);
+        all.push_back({gap, m_reels.canBePaired() ? newGaps[index] : AllTime, before, after});
+    }
+    for (const FrameRange& piece : m_pieces) {
+        auto around = std::partition_point(all.begin(), all.end(), [&piece](const Surroundings& other) {
+            return other.gap.frames().end <= piece.start;
+        });
+        for (; around != all.end() && around->gap.frames().start < piece.end; ++around)
+            around->gap.add(piece);
     }
     return all;
 }
 
-bool BlackCarrying::carryAttached(const Surroundings& around, const FrameRange& block)
+void BlackCarrying::follow(const FrameRange& source, std::int32_t shift, const FrameRange& room)
 {
-    const FrameRange& gap = around.oldFrames;
-    const bool touchesEnd = around.before != nullptr && block.start - gap.start < m_partingGap;
-    const bool touchesStart = around.after != nullptr && gap.end - block.end < m_partingGap;
-    if (touchesEnd && touchesStart) {
-        const bool keepsLength = gap.length() == around.newFrames.length();
-        follow(keepsLength ? gap : FrameRange{gap.start, block.end}, around.before->endShift(), around.newFrames,
-               block);
-    } else if (touchesEnd) {
-        follow({gap.start, block.end}, around.before->endShift(), around.newFrames, block);
-    } else if (touchesStart) {
-        follow({block.start, gap.end}, around.after->startShift(), around.newFrames, block);
-    }
-    return touchesEnd || touchesStart;
-}
-
-void BlackCarrying::follow(const FrameRange& source, std::int32_t shift, const FrameRange& room,
-                           const FrameRange& block)
-{
+    if (source.isEmpty())
+        return;
     if (shift != 0) {
-        const FrameRanges moving = within(source, within(block, m_allMaterial));
+        const FrameRanges moving = within(source, m_allMaterial);
         for (const FrameRange& range : without(moving, {m_day}))
             m_outsideOfDay.push_back(range);
         const FrameRange destinationDay = m_day.shiftedBy(-shift);

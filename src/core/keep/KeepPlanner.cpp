@@ -88,7 +88,7 @@ KeepPlan KeepPlanner::plan(const EventList& oldEvents, const EventList& newEvent
 
     CarriedStretches carried;
     PictureCarrying(oldLine, newLine, reels, carried).run(changeEvents, framerate);
-    BlackCarrying black(oldLine.lit(), newLine.lit(), reels, framesOfMaterial(m_context.material, framerate), framerate,
+    BlackCarrying black(oldLine.lit(), newLine.lit(), reels, framesOfEach(m_context.material, framerate), framerate,
                         carried);
     black.run(unhealedStretches(changeEvents, framerate));
 

@@ -33,11 +33,16 @@ FrameRange framesOf(const SecondsRange& range, const Framerate& framerate)
 
 FrameRanges framesOfMaterial(const std::vector<SecondsRange>& material, const Framerate& framerate)
 {
+    return united(framesOfEach(material, framerate));
+}
+
+std::vector<FrameRange> framesOfEach(const std::vector<SecondsRange>& material, const Framerate& framerate)
+{
     std::vector<FrameRange> frames;
     frames.reserve(material.size());
     for (const SecondsRange& range : material)
         frames.push_back(framesOf(range, framerate));
-    return united(std::move(frames));
+    return frames;
 }
 
 } // namespace cadrel::core

@@ -15,4 +15,7 @@ namespace cadrel::core {
 /// short. Throws Result::InvalidArgument for a range that ends before it starts or isn't of numbers.
 FrameRanges framesOfMaterial(const std::vector<SecondsRange>& material, const Framerate& framerate);
 
+/// The same for each of them, in their order. They may overlap.
+std::vector<FrameRange> framesOfEach(const std::vector<SecondsRange>& material, const Framerate& framerate);
+
 } // namespace cadrel::core

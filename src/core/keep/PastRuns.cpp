@@ -112,17 +112,17 @@ constexpr std::uint32_t BytesVersion = 0x52550001;
 void PastRuns::add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
                    const FrameRange& allowed)
 {
+    addStored(asStored(oldCut), asStored(newCut), asStored(changes), allowed);
+}
+
+void PastRuns::addStored(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+                         const FrameRange& allowed)
+{
     Run run = runOf(oldCut, newCut, changes, allowed);
     if (!run.isOfCuts() && run.changes.isEmpty())
         return;
     forgetWithin(run.extent);
     m_runs.push_back(std::move(run));
-}
-
-void PastRuns::forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                              const FrameRange& allowed)
-{
-    forgetWithin(runOf(oldCut, newCut, changes, allowed).extent);
 }
 
 void PastRuns::forgetWithin(const FrameRanges& extent)
@@ -160,8 +160,8 @@ std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut, c
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend(); ++run) {
         if (run->isOfCuts()) {
-            const PictureLine began(asStored(run->oldCut), names, framerate);
-            const PictureLine standing(asStored(run->newCut), names, framerate);
+            const PictureLine began(run->oldCut, names, framerate);
+            const PictureLine standing(run->newCut, names, framerate);
             const FrameRanges changed = common(within(run->allowed, reelsOf(standing.lit(), framerate)), givenReels);
             const FrameRanges unchanged = common(without(reelsOf(began.lit(), framerate), {run->allowed}), givenReels);
             if (const auto difference = firstDifferenceIn(without(changed, hidden), standing, given))
@@ -243,7 +243,7 @@ void PastRuns::read(const std::string& bytes)
             EventList changes;
             FrameRange allowed;
             archive >> oldCut >> newCut >> changes >> allowed.start >> allowed.end;
-            add(oldCut, newCut, changes, allowed);
+            addStored(oldCut, newCut, changes, allowed);
         }
     } catch (Result::Type) {
         m_runs.clear();

@@ -39,12 +39,9 @@ public:
 
     /// A run after those before it; the lists are as the model had them. Without both cuts it is one of a change EDL that
     /// was given. A run without events is none. Outside of `allowed` it changed nothing, so that the sound stands in the
-    /// old cut there. Shares the events.
+    /// old cut there. Keeps the events as a project stores them.
     void add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
              const FrameRange& allowed = AllTime);
-    /// Forgets the runs that such a run would hide altogether.
-    void forgetHiddenBy(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                        const FrameRange& allowed = AllTime);
 
     bool isEmpty() const { return m_runs.empty(); }
     std::size_t size() const { return m_runs.size(); }
@@ -72,6 +69,8 @@ private:
         bool isOfCuts() const { return !oldCut.isEmpty() || !newCut.isEmpty(); }
     };
 
+    void addStored(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+                   const FrameRange& allowed);
     Run runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
               const FrameRange& allowed) const;
     void forgetWithin(const FrameRanges& extent);

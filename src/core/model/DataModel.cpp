@@ -3,13 +3,15 @@
 #include "core/model/DataModel.h"
 
 #include "core/change/HealProcessing.h"
-#include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
+#include "core/edl/EventEdges.h"
 #include "core/notify/ChangeContext.h"
 #include "core/serialize/ByteArchive.h"
 #include "core/settings/VfxNameMatcher.h"
+#include "core/time/Framerate.h"
 #include "core/time/SecondsRange.h"
 
+#include <algorithm>
 #include <cstddef>
 #include <unordered_set>
 #include <utility>
@@ -25,32 +27,38 @@ constexpr std::uint32_t PersistenceVersion = 1;
 
 using Events = std::vector<std::shared_ptr<EventBase>>;
 
-/// Those of the events that are in the list.
-std::unordered_set<const EventBase*> membersOf(const EventList& list, const Events& events)
+/// Says for each of the events whether it is in the list.
+std::vector<bool> areIn(const EventList& list, const Events& events)
 {
-    std::unordered_set<const EventBase*> wanted;
-    wanted.reserve(events.size());
-    for (const auto& event : events)
-        wanted.insert(event.get());
-    std::unordered_set<const EventBase*> members;
-    members.reserve(wanted.size());
-    for (const auto& event : list.events()) {
-        if (wanted.contains(event.get()))
-            members.insert(event.get());
+    std::vector<bool> answers(events.size());
+    // Mostly they come in the list's order, and no set is needed.
+    auto place = list.events().begin();
+    std::size_t index = 0;
+    for (; index < events.size(); ++index) {
+        place = std::find(place, list.events().end(), events[index]);
+        if (place == list.events().end())
+            break;
+        answers[index] = true;
     }
-    return members;
+    if (index == events.size())
+        return answers;
+
+    std::unordered_set<const EventBase*> members;
+    members.reserve(list.size());
+    for (const auto& event : list.events())
+        members.insert(event.get());
+    for (; index < events.size(); ++index)
+        answers[index] = members.contains(events[index].get());
+    return answers;
 }
 
 /// Keeps events that it has not yet had, in the order in which they come.
 class DistinctEvents {
 public:
-    void add(const std::vector<std::weak_ptr<EventBase>>& events)
+    void add(const std::shared_ptr<EventBase>& event)
     {
-        for (const auto& reference : events) {
-            std::shared_ptr<EventBase> event(reference);
-            if (m_known.insert(event.get()).second)
-                m_events.push_back(std::move(event));
-        }
+        if (m_known.insert(event.get()).second)
+            m_events.push_back(event);
     }
     Events take() { return std::move(m_events); }
 
@@ -59,15 +67,16 @@ private:
     std::unordered_set<const EventBase*> m_known;
 };
 
-/// The events of a programme that play from `in` to `out`, in the map's order. One may be there twice.
-std::vector<std::weak_ptr<EventBase>> eventsPlaying(const CutMap& programme, const Timecode& in, const Timecode& out)
+/// Calls `take` with the events of a programme that play in a range, in the order of their edges. It may get one twice.
+template <class Take>
+void forEachPlaying(const EventEdges& programme, const SecondsRange& range, const Take& take)
 {
     // Shrunk, so that a neighbour that merely touches isn't hit.
-    const double start = in.toSeconds() + SameInstant;
-    const double end = out.toSeconds() - SameInstant;
+    const double start = range.start + SameInstant;
+    const double end = range.end - SameInstant;
     if (start > end)
         throw Result::InvalidArgument;
-    return programme.eventsInDestinationRange(start, end);
+    programme.forEachInRange(start, end, take);
 }
 
 } // namespace
@@ -236,28 +245,31 @@ template <class Take>
 void DataModel::forEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents, const EventList& programme,
                                 TimecodeOf in, TimecodeOf out, const Take& take) const
 {
-    const std::unordered_set<const EventBase*> members = membersOf(m_changeEdl, changeEvents);
-    if (members.empty())
+    const std::vector<bool> areMembers = areIn(m_changeEdl, changeEvents);
+    if (std::find(areMembers.begin(), areMembers.end(), true) == areMembers.end())
         return;
-    const CutMap map(programme, Timecode::framerate());
+    const Framerate framerate = Timecode::framerate();
+    const EventEdges edges(programme.events(), &EventBase::dstIn, &EventBase::dstOut, framerate);
     for (std::size_t index = 0; index < changeEvents.size(); ++index) {
         const std::shared_ptr<EventBase>& change = changeEvents[index];
-        if (members.contains(change.get()) && !change->hasFlaw(EventFlaw::TimecodeInvalid) &&
-            change->srcIn() < change->srcOut() && change->dstIn() < change->dstOut())
-            take(index, eventsPlaying(map, (change.get()->*in)(), (change.get()->*out)()));
+        if (areMembers[index] && !change->hasFlaw(EventFlaw::TimecodeInvalid) && change->srcIn() < change->srcOut() &&
+            change->dstIn() < change->dstOut())
+            forEachPlaying(edges,
+                           {(change.get()->*in)().toSeconds(framerate), (change.get()->*out)().toSeconds(framerate)},
+                           [&](const std::shared_ptr<EventBase>& event) { take(index, event); });
     }
 }
 
 std::vector<EventList> DataModel::eventsFor(const std::vector<std::shared_ptr<EventBase>>& changeEvents,
                                             const EventList& programme, TimecodeOf in, TimecodeOf out) const
 {
-    std::vector<EventList> found(changeEvents.size());
-    forEventsBehind(changeEvents, programme, in, out, [&](std::size_t index, const auto& events) {
-        DistinctEvents distinct;
-        distinct.add(events);
-        found[index].append(distinct.take());
-    });
-    return found;
+    std::vector<DistinctEvents> found(changeEvents.size());
+    forEventsBehind(changeEvents, programme, in, out,
+                    [&](std::size_t index, const auto& event) { found[index].add(event); });
+    std::vector<EventList> lists(found.size());
+    for (std::size_t index = 0; index < found.size(); ++index)
+        lists[index].append(found[index].take());
+    return lists;
 }
 
 std::vector<std::shared_ptr<EventBase>>
@@ -265,7 +277,7 @@ DataModel::eventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEve
                         TimecodeOf in, TimecodeOf out) const
 {
     DistinctEvents found;
-    forEventsBehind(changeEvents, programme, in, out, [&](std::size_t, const auto& events) { found.add(events); });
+    forEventsBehind(changeEvents, programme, in, out, [&](std::size_t, const auto& event) { found.add(event); });
     return found.take();
 }
 

@@ -40,7 +40,8 @@ struct PropertyKey {
         NewTableSelection = 10018,      ///< string, likewise
         ChangeTableSelection = 10019,   ///< string, likewise
         PreviewAtDestination = 10020,   ///< bool
-        EarlierRuns = 10022,            ///< string, the bytes of PastRuns without the run that the lists tell of
+        EarlierRuns = 10022,            ///< string, of older versions: all runs but the one that the lists tell of
+        DoneRuns = 10023,               ///< string, the bytes of PastRuns; see RunRecord
     };
 };
 
@@ -129,7 +130,7 @@ private:
     util::Result::Type generateAndHeal(const GenerationFailureListener& onFailure);
     std::array<ChangeContextNotificationBase*, 5> sources();
     using TimecodeOf = const Timecode& (EventBase::*)() const;
-    /// Calls `take` with the index of each change event that has a range, and with the events of an EDL that play in it.
+    /// Calls `take` for each change event that has a range, with its index and each event of an EDL that plays in it.
     template <class Take>
     void forEventsBehind(const std::vector<std::shared_ptr<EventBase>>& changeEvents, const EventList& programme,
                          TimecodeOf in, TimecodeOf out, const Take& take) const;

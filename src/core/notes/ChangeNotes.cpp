@@ -121,11 +121,13 @@ std::size_t ChangeNotes::joinedSteps() const
     return joined;
 }
 
-std::int32_t ChangeNotes::timecodeOf(const WorkPlace& place) const
+std::int32_t ChangeNotes::timecodeOf(const WorkPlace& place, std::size_t reel) const
 {
     const ReelChange& pair = m_reels[place.reel].pair;
-    const Reel& reel = pair.newReel ? m_newCut.reels()[*pair.newReel] : m_oldCut.reels()[*pair.oldReel];
-    return reel.timecodeStart + place.frame;
+    const bool hasItsNewStart = place.reel <= reel || !pair.oldReel;
+    return (hasItsNewStart && pair.newReel ? m_newCut.reels()[*pair.newReel] : m_oldCut.reels()[*pair.oldReel])
+               .timecodeStart +
+           place.frame;
 }
 
 std::int32_t ChangeNotes::oldTimecode(std::int32_t frame) const
@@ -180,7 +182,8 @@ std::int32_t extentOf(const NoteStep& step)
     case StepAction::Move:
         return step.moved;
     case StepAction::Relabel:
-        return 0; // the picture stays where it is
+    case StepAction::MoveReel:
+        return 0; // all of the picture stays
     case StepAction::Replace:
         break;
     }
@@ -200,10 +203,12 @@ std::size_t otherShots(const NoteStep& step, const PictureChange& named)
         return !isSeen;
     };
     isAnother(named);
-    return static_cast<std::size_t>(
-        std::count_if(step.changes.begin(), step.changes.end(), [&](const PictureChange& change) {
-            return &change != &named && change.kind != ChangeKind::Unchanged && isAnother(change);
-        }));
+    std::size_t others = 0;
+    for (const PictureChange& change : step.changes) {
+        if (&change != &named && change.kind != ChangeKind::Unchanged && isAnother(change))
+            others += static_cast<std::size_t>(change.shots);
+    }
+    return others;
 }
 
 } // namespace cadrel::core

@@ -76,9 +76,9 @@ public:
     /// How many steps were joined into others.
     std::size_t joinedSteps() const;
 
-    /// The frame count of the timecode of a place in the programme as it is at a step: counted from the start of the new
-    /// reel, or the old one where it is gone.
-    std::int32_t timecodeOf(const WorkPlace& place) const;
+    /// The frame count of the timecode of a place in the programme as it is at a row of `reel`, after the step that moves that
+    /// reel: the reels up to this one begin where they do in the new cut by then, and the others where they did in the old one.
+    std::int32_t timecodeOf(const WorkPlace& place, std::size_t reel) const;
     /// Of a frame of the old or the new programme.
     std::int32_t oldTimecode(std::int32_t frame) const;
     std::int32_t newTimecode(std::int32_t frame) const;

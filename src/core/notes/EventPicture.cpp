@@ -14,8 +14,6 @@ namespace cadrel::core {
 
 namespace {
 
-constexpr double FreezeSpeed = 0.0;
-
 /// Separates the parts of a material's text; no name of an EDL holds it.
 constexpr char Separator = '\n';
 
@@ -53,7 +51,8 @@ std::int32_t firstSourceFrame(const EventBase& event, const Framerate& framerate
 
 } // namespace
 
-EventPicture::EventPicture(const EventList& events, std::size_t index, const PictureRules& rules, TextNumbers& numbers)
+EventPicture::EventPicture(const EventList& events, std::size_t index, const EventBase* before,
+                           const PictureRules& rules, TextNumbers& numbers)
     : m_event(static_cast<std::int32_t>(index)),
       m_name(numbers.numberOf(materialText("name", {plainNameOf(events.at(index), rules)})))
 {
@@ -71,14 +70,16 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Pic
     }
     const double source = firstSourceFrame(event, rules.framerate);
     const double speed = event.motionSpeed();
-    if (EventBase::areSameSpeed(speed, FreezeSpeed))
+    if (isFreeze(event, rules.framerate))
         m_body = {numbers.numberOf(materialText("freeze", {key, event.srcIn().toString()})), version, 0.0, 1.0};
     else
         m_body = {numbers.numberOf(materialText("clip", {key})), version, source, event.isNormalSpeed() ? 1.0 : speed};
     if (!event.isTransition() || event.transitionDuration() <= 0)
         return;
 
-    const EventBase* const outgoing = outgoingOf(events, index);
+    const EventBase* outgoing = outgoingOf(events, index);
+    if (outgoing == nullptr && before != nullptr && before->dstOut() == event.dstIn())
+        outgoing = before;
     const std::string outgoingName = outgoing == nullptr ? std::string() : nameBy(rules.matchBy, *outgoing);
     const std::string text =
         materialText("transition", {std::to_string(event.transitionType()), std::to_string(event.transitionDuration()),
@@ -103,6 +104,15 @@ ShownRun EventPicture::runFrom(std::int32_t from) const
             .sourceStep = material.sourceStep,
             .event = m_event,
             .isTransition = isTransition};
+}
+
+bool isFreeze(const EventBase& event, const Framerate& framerate)
+{
+    if (!event.isValid())
+        return false;
+    const std::int32_t source = event.srcOut().toFrameCount(framerate) - event.srcIn().toFrameCount(framerate);
+    const std::int32_t shown = event.dstOut().toFrameCount(framerate) - event.dstIn().toFrameCount(framerate);
+    return source == 0 || (source == 1 && shown > 1);
 }
 
 bool tellsNothing(const std::string& name)

@@ -9,8 +9,10 @@ namespace cadrel::core {
 /// What an event shows, before it is known which part of it is seen.
 class EventPicture {
 public:
-    /// For the event at `index`, which has a place in the programme.
-    EventPicture(const EventList& events, std::size_t index, const PictureRules& rules, TextNumbers& numbers);
+    /// For the event at `index`, which has a place in the programme. `before` is what is seen right before it, or null; it is
+    /// the outgoing side of a transition in one line where it ends there.
+    EventPicture(const EventList& events, std::size_t index, const EventBase* before, const PictureRules& rules,
+                 TextNumbers& numbers);
 
     /// Where its transition ends, from its first frame; 0 without one.
     std::int32_t transitionLength() const { return m_transition ? m_transitionLength : 0; }
@@ -32,6 +34,9 @@ private:
     std::optional<Material> m_transition;
     std::int32_t m_transitionLength = 0;
 };
+
+/// Whether an event shows a single frame of its source in all of its frames.
+bool isFreeze(const EventBase& event, const Framerate& framerate);
 
 /// Whether a name tells nothing of the material.
 bool tellsNothing(const std::string& name);

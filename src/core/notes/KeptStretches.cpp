@@ -89,6 +89,7 @@ public:
         for (const SharedPicture& stretch : longestChain(m_shared))
             keep(stretch.oldStart, stretch.newStart, stretch.length, false);
         keepLongest(false);
+        keepGapsBesideMoves();
         keepLongest(true);
         return joined();
     }
@@ -144,6 +145,37 @@ private:
                 offers.add(now);
             }
         }
+    }
+
+    /// A gap that has come along with the shot before or after it.
+    void keepGapsBesideMoves()
+    {
+        std::map<std::int32_t, std::int32_t> oldEnds; // by where they end in the new programme
+        std::map<std::int32_t, std::int32_t> oldStarts;
+        for (const KeptStretch& kept : m_kept) {
+            oldEnds[kept.newEnd()] = kept.oldEnd();
+            oldStarts[kept.newStart] = kept.oldStart;
+        }
+        for (const ShownRun& gap : m_newCut.runs()) {
+            if (!gap.isGap())
+                continue;
+            if (const auto before = oldEnds.find(gap.start); before != oldEnds.end())
+                keepGap(gap, before->second);
+            if (const auto after = oldStarts.find(gap.end()); after != oldStarts.end())
+                keepGap(gap, after->second - gap.length);
+        }
+    }
+
+    /// Where the same gap stands there in the old programme, and both are free.
+    void keepGap(const ShownRun& gap, std::int32_t oldStart)
+    {
+        if (oldStart < 0 || oldStart >= m_oldCut.length())
+            return;
+        const ShownRun& old = m_oldCut.runs()[m_oldCut.runAt(oldStart)];
+        if (old.isGap() && old.start == oldStart && old.length == gap.length &&
+            m_takenNew.nextIn(gap.start, gap.end()) == gap.end() &&
+            m_takenOld.nextIn(old.start, old.end()) == old.end())
+            keep(oldStart, gap.start, gap.length, false);
     }
 
     std::vector<KeptStretch> joined()

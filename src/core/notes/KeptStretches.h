@@ -24,7 +24,8 @@ struct KeptStretch {
 /// All picture of the new programme that stands in the old one, in the order of the new programme. Stretches are as long
 /// as they can be and lie within one reel on both sides. Each old frame goes to one new frame, where there is a choice so
 /// that as many frames as possible keep their order. Further uses of an old frame are
-/// doubled, unless they only make a kept shot longer. The frames of a gap are kept only where they keep their order.
+/// doubled, unless they only make a kept shot longer. The frames of a gap are kept where they keep their order, and all of them
+/// where they move with the shot before or after them.
 ///
 /// The time is n log n. Where more than a few dozen old shots use the same stretch of source, those nearest to the place
 /// of the new shot are looked at.

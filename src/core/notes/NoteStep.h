@@ -4,6 +4,7 @@
 
 #include "core/notes/KeptStretches.h"
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <optional>
@@ -38,17 +39,21 @@ enum class ChangeKind {
     TransitionRemoved, ///< a cut where a dissolve or wipe was
     TransitionChanged, ///< a dissolve or wipe of another length, type or place
     Unchanged,         ///< kept picture between joined trims, which their step replaces by itself
+    ReelMoved,         ///< a reel begins at another timecode
 };
 
 struct PictureChange {
     ChangeKind kind{};
-    std::int32_t frames = 0;            ///< of a trim, signed by what the shot wins; else how long the picture is now
+    std::int32_t frames = 0; ///< of a trim, signed by what the shot wins; of a reel, by how much later it begins;
+                             ///< else how long the picture is now
     const EventBase* oldShot = nullptr; ///< in the old cut; null where there is none
     const EventBase* newShot = nullptr; ///< in the new cut; null where there is none
     std::optional<FrameSpan> inOld;     ///< where it stood, in the frames of the old programme
     std::optional<FrameSpan> inNew;     ///< where it stands
-    std::int32_t shots = 1;             ///< of a move, and of unchanged picture: how many shots
+    std::int32_t shots = 1;             ///< of moved, doubled and unchanged picture: how many shots
     bool isPart = false;                ///< of a lift: the rest of the shot stays somewhere
+    bool hasOldTransition = false;      ///< the dissolve or wipe of the old shot goes with it
+    bool hasNewTransition = false;      ///< the new shot brings its dissolve or wipe
 };
 
 /// Where frames are in the programme as it is when all steps before have been carried out.
@@ -60,13 +65,14 @@ struct WorkPlace {
 };
 
 enum class StepAction {
-    Replace, ///< delete `removed` frames at `place`, then insert `inserted` there; one of them may be empty
-    Move,    ///< take `moved` frames out at `from` and insert them at `place`, which is counted without them
-    Relabel, ///< the frames at `place` stay and are replaced by `inserted`, which show another version of them
+    Replace,  ///< delete `removed` frames at `place`, then insert `inserted` there; one of them may be empty
+    Move,     ///< take `moved` frames out at `from` and insert them at `place`, which is counted without them
+    Relabel,  ///< the frames at `place` stay and are replaced by `inserted`, which show another version of them
+    MoveReel, ///< all of the reel of `place` is moved to the timecode at which it begins in the new cut
 };
 
 /// One step of the way from the old cut to the new one. Steps are in the order of the new programme. Before the place of
-/// a step that replaces, all is as it is in the new cut.
+/// a step that replaces, all is as it is in the new cut. A reel that begins elsewhere is moved by its first step.
 struct NoteStep {
     StepAction action = StepAction::Replace;
     WorkPlace place;
@@ -79,6 +85,8 @@ struct NoteStep {
     std::vector<PictureChange> changes; ///< at least one
     std::size_t joined = 1;             ///< of so many steps this one is made, new versions not counted
 
+    /// The reel of whose rows it is one: of a move between reels that which comes first.
+    std::size_t reel() const { return action == StepAction::Move ? std::min(from.reel, place.reel) : place.reel; }
     /// What the reel of `place` wins or loses where it is no move within the reel.
     std::int32_t lengthChange() const { return action == StepAction::Replace ? inserted.length - removed : 0; }
 };

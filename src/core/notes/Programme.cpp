@@ -97,7 +97,8 @@ std::vector<DoubtfulEvent> doubtsOf(const EventList& events, const PictureRules&
             add(PictureDoubt::NoPicture);
             continue;
         }
-        if (event.hasFlaw(EventFlaw::TimecodeRangeInvalid))
+        // A timecode that can't be read puts no event in any order.
+        if (event.hasFlaw(EventFlaw::TimecodeRangeInvalid) && !event.hasFlaw(EventFlaw::TimecodeInvalid))
             add(PictureDoubt::Reversed);
         else if (!event.isValid())
             add(PictureDoubt::Flawed);
@@ -126,6 +127,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
         m_reels.back().length += runLength;
     };
     std::int32_t lastOut = 0;
+    const EventBase* before = nullptr;
     for (const Seen& stretch : seen) {
         const std::int32_t gap = stretch.in - lastOut;
         if (m_reels.empty() || gap >= gapBetweenReels)
@@ -133,7 +135,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
         else if (gap > 0)
             append({0, 0, gapMaterial, gapMaterial, gapMaterial, 0.0, 1.0, ShownRun::NoEvent, false}, gap);
         const EventBase& event = events.at(static_cast<std::size_t>(stretch.event));
-        const EventPicture picture(events, static_cast<std::size_t>(stretch.event), rules, numbers);
+        const EventPicture picture(events, static_cast<std::size_t>(stretch.event), before, rules, numbers);
         const std::int32_t dstIn = event.dstIn().toFrameCount(rules.framerate);
         const std::int32_t from = stretch.in - dstIn;
         const std::int32_t to = stretch.out - dstIn;
@@ -143,6 +145,7 @@ Programme::Programme(const EventList& events, const PictureRules& rules, TextNum
         if (body < to)
             append(picture.runFrom(body), to - body);
         lastOut = stretch.out;
+        before = &event;
     }
 }
 

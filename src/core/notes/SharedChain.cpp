@@ -69,12 +69,14 @@ private:
     std::size_t m_count = 0;
 };
 
+/// What of an old run a stretch uses.
 struct Use {
-    SharedPicture stretch;
-    std::size_t index = 0;
+    std::int32_t oldStart;
+    std::int32_t oldEnd;
+    std::size_t index; ///< of the stretch
 };
 
-/// The last uses of each old run. They lie together in memory, as they are looked at over and over.
+/// The last uses of each old run. They are small and lie together in memory, as they are looked at over and over.
 class LastUses {
 public:
     explicit LastUses(const std::vector<SharedPicture>& shared)
@@ -90,9 +92,9 @@ public:
     {
         OfRun& run = m_ofRuns[stretch.oldRun];
         if (run.uses.size() < MostUsesLookedAt)
-            run.uses.push_back({stretch, index});
+            run.uses.push_back({stretch.oldStart, stretch.oldEnd(), index});
         else
-            run.uses[run.next++ % MostUsesLookedAt] = {stretch, index};
+            run.uses[run.next++ % MostUsesLookedAt] = {stretch.oldStart, stretch.oldEnd(), index};
     }
 
 private:
@@ -162,8 +164,8 @@ private:
             consider(m_shared[before], before);
         // Those that end where this one starts, or before it, have been asked for by their ends.
         for (const Use& use : m_uses.of(stretch.oldRun)) {
-            if (use.stretch.oldEnd() > stretch.oldStart)
-                consider(use.stretch, use.index);
+            if (use.oldStart < stretch.oldStart && stretch.oldStart < use.oldEnd && use.oldEnd < stretch.oldEnd())
+                consider(m_shared[use.index], use.index);
         }
         m_before[index] = best.last;
         m_chains[index] = {best.worth + stretch.length * Chain::FrameWorth, index};

@@ -84,6 +84,46 @@ void letStay(std::vector<KeptBlock>& blocks, const std::vector<std::size_t>& can
         blocks[candidates[index]].stays = true;
 }
 
+/// Reels without common picture that begin at the same timecode.
+void pairByStart(std::vector<ReelChange>& pairs, std::vector<bool>& isTaken, const Programme& oldCut,
+                 const Programme& newCut)
+{
+    std::map<std::int32_t, std::size_t> oldReels;
+    for (std::size_t oldReel = 0; oldReel < isTaken.size(); ++oldReel)
+        oldReels[oldCut.reels()[oldReel].timecodeStart] = oldReel;
+    for (ReelChange& pair : pairs) {
+        const auto found = oldReels.find(newCut.reels()[*pair.newReel].timecodeStart);
+        if (pair.oldReel || found == oldReels.end() || isTaken[found->second])
+            continue;
+        pair.oldReel = found->second;
+        isTaken[found->second] = true;
+    }
+}
+
+/// Reels without common picture of which as many stand between the same reels in both cuts.
+void pairBetweenNeighbours(std::vector<ReelChange>& pairs, std::vector<bool>& isTaken)
+{
+    for (std::size_t first = 0; first < pairs.size(); ++first) {
+        if (pairs[first].oldReel)
+            continue;
+        std::size_t end = first;
+        while (end < pairs.size() && !pairs[end].oldReel)
+            ++end;
+        const std::size_t oldFirst = first == 0 ? 0 : *pairs[first - 1].oldReel + 1;
+        std::size_t oldEnd = oldFirst;
+        while (oldEnd < isTaken.size() && !isTaken[oldEnd])
+            ++oldEnd;
+        const bool endsAlike = end == pairs.size() ? oldEnd == isTaken.size() : oldEnd == *pairs[end].oldReel;
+        if (endsAlike && oldEnd - oldFirst == end - first) {
+            for (std::size_t reel = first; reel < end; ++reel) {
+                pairs[reel].oldReel = oldFirst + reel - first;
+                isTaken[oldFirst + reel - first] = true;
+            }
+        }
+        first = end - 1;
+    }
+}
+
 } // namespace
 
 std::vector<ReelChange> pairReels(const Programme& oldCut, const Programme& newCut,
@@ -105,19 +145,14 @@ std::vector<ReelChange> pairReels(const Programme& oldCut, const Programme& newC
         pairs[newReel].oldReel = oldReel;
         isTaken[oldReel] = true;
     }
-    std::size_t nextOld = 0;
-    const auto skipTaken = [&] {
-        while (nextOld < isTaken.size() && isTaken[nextOld])
-            ++nextOld;
-        return nextOld < isTaken.size();
-    };
-    for (std::size_t newReel = 0; newReel < pairs.size(); ++newReel) {
+    for (std::size_t newReel = 0; newReel < pairs.size(); ++newReel)
         pairs[newReel].newReel = newReel;
-        if (!pairs[newReel].oldReel && skipTaken())
-            pairs[newReel].oldReel = nextOld++;
+    pairByStart(pairs, isTaken, oldCut, newCut);
+    pairBetweenNeighbours(pairs, isTaken);
+    for (std::size_t oldReel = 0; oldReel < isTaken.size(); ++oldReel) {
+        if (!isTaken[oldReel])
+            pairs.push_back({oldReel, std::nullopt});
     }
-    for (; skipTaken(); ++nextOld)
-        pairs.push_back({nextOld, std::nullopt});
     return pairs;
 }
 

@@ -21,8 +21,8 @@ struct KeptBlock {
     bool stays = false; ///< else it has to be moved
 };
 
-/// Brings together each new reel and the old one whose picture it has most of; reels without any common picture go
-/// together in their order. The new reels come first, in order, then old ones that are gone.
+/// Brings together each new reel and the old one whose picture it has most of; of reels without any common picture those
+/// that begin at the same timecode, and as many as stand between the same other reels. The new reels come first, in order, then old ones that are gone.
 std::vector<ReelChange> pairReels(const Programme& oldCut, const Programme& newCut,
                                   const std::vector<KeptStretch>& kept);
 

@@ -44,6 +44,15 @@ std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameSpan& fra
     return pieces;
 }
 
+/// How many shots there are; a gap is none.
+std::int32_t shotsIn(const Programme& programme, const FrameSpan& frames)
+{
+    const std::vector<ShotPiece> pieces = piecesOf(programme, frames);
+    const auto shots = std::count_if(pieces.begin(), pieces.end(),
+                                     [](const ShotPiece& piece) { return piece.event != ShownRun::NoEvent; });
+    return std::max<std::int32_t>(1, static_cast<std::int32_t>(shots));
+}
+
 std::int32_t eventAt(const Programme& programme, std::int32_t frame)
 {
     return programme.runs()[programme.runAt(frame)].event;
@@ -52,6 +61,17 @@ std::int32_t eventAt(const Programme& programme, std::int32_t frame)
 const EventBase* shotOf(const Programme& programme, std::int32_t event)
 {
     return event == ShownRun::NoEvent ? nullptr : &programme.events().at(static_cast<std::size_t>(event));
+}
+
+/// Null where there are only gaps.
+const EventBase* firstShotOf(const Programme& programme, const FrameSpan& frames)
+{
+    const auto& runs = programme.runs();
+    for (std::size_t run = programme.runAt(frames.start); run < runs.size() && runs[run].start < frames.end(); ++run) {
+        if (!runs[run].isGap())
+            return programme.eventOf(runs[run]);
+    }
+    return nullptr;
 }
 
 /// The frames of a programme that an event is seen in around a frame of it.
@@ -79,9 +99,9 @@ struct Trim {
 /// Works out the changes of one step.
 class Description {
 public:
-    Description(const Programme& oldCut, const Programme& newCut, const NoteStep& step, const StepSurroundings& around,
-                const std::vector<KeptStretch>& doubled)
-        : m_oldCut(oldCut), m_newCut(newCut), m_around(around)
+    Description(const StepChanges& tellers, const Programme& oldCut, const Programme& newCut, const NoteStep& step,
+                const StepSurroundings& around, const std::vector<KeptStretch>& doubled)
+        : m_tellers(tellers), m_oldCut(oldCut), m_newCut(newCut), m_around(around)
     {
         for (const FrameSpan& frames : step.removedFrames) {
             const auto pieces = piecesOf(oldCut, frames);
@@ -152,9 +172,9 @@ private:
         if (&first == &last && endsShotBefore && beginsShotAfter)
             return; // a part out of the middle of a shot
         if (endsShotBefore)
-            addRemoved(m_around.beforeInOld == m_around.beforeInNew ? m_tail : m_otherTail, first);
+            addRemoved(beginsAlike() ? m_tail : m_otherTail, first);
         if (beginsShotAfter)
-            addRemoved(m_around.afterInOld == m_around.afterInNew ? m_head : m_otherHead, last);
+            addRemoved(endsAlike() ? m_head : m_otherHead, last);
     }
 
     void addRemoved(Trim& trim, ShotPiece& piece)
@@ -175,6 +195,9 @@ private:
         piece.isTold = true;
     }
 
+    bool beginsAlike() const { return m_around.beforeInOld == m_around.beforeInNew; }
+    bool endsAlike() const { return m_around.afterInOld == m_around.afterInNew; }
+
     /// Of a transition into a shot that stays. What the trims on both sides of it take from each other comes from the
     /// transition alone.
     void tellTransition()
@@ -185,38 +208,67 @@ private:
         change.kind = !m_oldTransition   ? ChangeKind::TransitionAdded
                       : !m_newTransition ? ChangeKind::TransitionRemoved
                                          : ChangeKind::TransitionChanged;
-        const Trim& trim = m_head.oldShot != nullptr || m_head.newShot != nullptr ? m_head : m_otherHead;
-        change.oldShot = trim.oldShot != nullptr ? trim.oldShot : oldShotAfter();
-        change.newShot = trim.newShot != nullptr ? trim.newShot : newShotAfter();
-        change.inOld = trim.inOld;
-        change.inNew = trim.inNew;
+        const Trim& oldHead = m_head.oldShot != nullptr ? m_head : m_otherHead;
+        change.oldShot = oldHead.oldShot != nullptr ? oldHead.oldShot : oldShotAfter();
+        change.newShot = m_head.newShot != nullptr ? m_head.newShot : newShotAfter();
+        change.inOld = oldHead.inOld;
+        change.inNew = m_head.inNew;
         if (m_newTransition && change.newShot != nullptr)
             change.frames = change.newShot->transitionDuration();
         m_changes.push_back(change);
         moveCutsToCentres(change);
     }
 
+    /// Whether the shot before the step goes out in the transition of the last of the pieces.
+    static bool goesOutOfShotBefore(const std::vector<ShotPiece>& pieces)
+    {
+        return pieces.size() == 1 || (pieces.size() == 2 && pieces.front().isTold);
+    }
+
     /// The shots of a transition are taken to meet in the middle of it.
     void moveCutsToCentres(const PictureChange& transition)
     {
-        if (!m_around.beforeInNew || !m_around.afterInNew)
-            return;
-        const auto lengthOf = [](bool hasTransition, const EventBase* shot) {
-            return hasTransition && shot != nullptr ? shot->transitionDuration() : 0;
+        const auto halfOf = [](bool hasTransition, const EventBase* shot) {
+            return hasTransition && shot != nullptr ? shot->transitionDuration() / 2 : 0;
         };
-        const std::int32_t shift =
-            lengthOf(m_newTransition, transition.newShot) / 2 - lengthOf(m_oldTransition, transition.oldShot) / 2;
-        m_tail.fromTransition = shift;
-        m_head.fromTransition = -shift;
-        if (m_tail.change() == -m_head.change()) {
+        if (m_oldTransition && m_around.afterInOld && (m_old.size() > 1 || m_around.beforeInOld)) {
+            const std::int32_t half = halfOf(true, transition.oldShot);
+            (endsAlike() ? m_head : m_otherHead).fromTransition += half;
+            if (m_around.beforeInOld && goesOutOfShotBefore(m_old))
+                (beginsAlike() ? m_tail : m_otherTail).fromTransition -= half;
+        }
+        if (m_newTransition && m_around.afterInNew && (m_new.size() > 1 || m_around.beforeInNew)) {
+            const std::int32_t half = halfOf(true, transition.newShot);
+            m_head.fromTransition -= half;
+            if (m_around.beforeInNew && goesOutOfShotBefore(m_new))
+                m_tail.fromTransition += half;
+        }
+        const bool isOneCut = !m_oldTransition || (beginsAlike() && endsAlike());
+        if (isOneCut && !isSameTransition(transition) && m_tail.change() == -m_head.change()) {
             m_tail = {};
             m_head = {};
             return;
         }
-        if (m_tail.oldShot == nullptr && m_tail.newShot == nullptr)
+        nameTrims();
+    }
+
+    static bool isSameTransition(const PictureChange& change)
+    {
+        return change.kind == ChangeKind::TransitionChanged && change.oldShot != nullptr && change.newShot != nullptr &&
+               change.oldShot->transitionType() == change.newShot->transitionType() &&
+               change.oldShot->transitionDuration() == change.newShot->transitionDuration();
+    }
+
+    /// Those that have nothing but what a transition lets them win.
+    void nameTrims()
+    {
+        const auto isNameless = [](const Trim& trim) { return trim.oldShot == nullptr && trim.newShot == nullptr; };
+        if (isNameless(m_tail) && m_around.beforeInNew)
             m_tail.newShot = shotOf(m_newCut, eventAt(m_newCut, m_around.beforeInNew->newEnd() - 1));
-        if (m_head.oldShot == nullptr && m_head.newShot == nullptr)
+        if (isNameless(m_head) && m_around.afterInNew)
             m_head.newShot = shotOf(m_newCut, eventAt(m_newCut, m_around.afterInNew->newStart));
+        if (isNameless(m_otherTail) && m_around.beforeInOld)
+            m_otherTail.oldShot = shotOf(m_oldCut, eventAt(m_oldCut, m_around.beforeInOld->oldEnd() - 1));
     }
 
     const EventBase* oldShotAfter() const
@@ -226,9 +278,12 @@ private:
                                      : nullptr;
     }
 
+    /// Of a transition that is removed it is the shot that had it, wherever it stands now.
     const EventBase* newShotAfter() const
     {
-        return m_around.afterInNew ? shotOf(m_newCut, eventAt(m_newCut, m_around.afterInNew->newStart)) : nullptr;
+        const std::optional<KeptStretch>& after =
+            m_newTransition || !m_around.afterInOld ? m_around.afterInNew : m_around.afterInOld;
+        return after ? shotOf(m_newCut, eventAt(m_newCut, after->newStart)) : nullptr;
     }
 
     void tellTrim(ChangeKind kind, const Trim& trim)
@@ -254,6 +309,8 @@ private:
         change.newShot = shotOf(m_newCut, newPiece.event);
         change.inOld = oldPiece.frames;
         change.inNew = newPiece.frames;
+        change.hasOldTransition = oldPiece.hasTransition;
+        change.hasNewTransition = newPiece.hasTransition;
         oldPiece.isTold = true;
         newPiece.isTold = true;
         m_changes.push_back(change);
@@ -313,6 +370,7 @@ private:
             change.oldShot = shotOf(m_oldCut, piece.event);
             change.inOld = piece.frames;
             change.isPart = !isWhole(m_oldCut, piece);
+            change.hasOldTransition = piece.hasTransition;
             m_changes.push_back(change);
         }
         auto doubled = m_doubled.begin();
@@ -327,21 +385,39 @@ private:
             change.newShot = shotOf(m_newCut, piece.event);
             change.inNew = piece.frames;
             change.isPart = !isWhole(m_newCut, piece);
+            change.hasNewTransition = piece.hasTransition;
             m_changes.push_back(change);
         }
         for (; doubled != m_doubled.end(); ++doubled)
             tellDoubled(*doubled);
     }
 
+    /// A shot of another version than in the old cut is a change of its own.
     void tellDoubled(const KeptStretch& stretch)
+    {
+        std::int32_t frame = stretch.newStart;
+        const auto tellUpTo = [&](std::int32_t end) {
+            if (frame < end)
+                tellDoubled({frame + stretch.oldStart - stretch.newStart, end - frame}, {frame, end - frame});
+            frame = end;
+        };
+        for (const PictureChange& version : m_tellers.ofVersions(stretch)) {
+            tellUpTo(version.inNew->start);
+            tellUpTo(version.inNew->end());
+        }
+        tellUpTo(stretch.newEnd());
+    }
+
+    void tellDoubled(const FrameSpan& inOld, const FrameSpan& inNew)
     {
         PictureChange change;
         change.kind = ChangeKind::Doubled;
-        change.frames = stretch.length;
-        change.oldShot = shotOf(m_oldCut, eventAt(m_oldCut, stretch.oldStart));
-        change.newShot = shotOf(m_newCut, eventAt(m_newCut, stretch.newStart));
-        change.inOld = {stretch.oldStart, stretch.length};
-        change.inNew = {stretch.newStart, stretch.length};
+        change.frames = inNew.length;
+        change.oldShot = shotOf(m_oldCut, eventAt(m_oldCut, inOld.start));
+        change.newShot = shotOf(m_newCut, eventAt(m_newCut, inNew.start));
+        change.inOld = inOld;
+        change.inNew = inNew;
+        change.shots = shotsIn(m_newCut, inNew);
         m_changes.push_back(change);
     }
 
@@ -362,6 +438,7 @@ private:
         }
     }
 
+    const StepChanges& m_tellers;
     const Programme& m_oldCut;
     const Programme& m_newCut;
     const StepSurroundings& m_around;
@@ -382,7 +459,7 @@ private:
 std::vector<PictureChange> StepChanges::ofReplacing(const NoteStep& step, const StepSurroundings& around,
                                                     const std::vector<KeptStretch>& doubled) const
 {
-    return Description(m_oldCut, m_newCut, step, around, doubled).make();
+    return Description(*this, m_oldCut, m_newCut, step, around, doubled).make();
 }
 
 PictureChange StepChanges::ofMoving(FrameSpan inOld, FrameSpan inNew) const
@@ -415,9 +492,9 @@ PictureChange StepChanges::ofKept(ChangeKind kind, FrameSpan inOld, FrameSpan in
     change.frames = inOld.length;
     change.inOld = inOld;
     change.inNew = inNew;
-    change.oldShot = shotOf(m_oldCut, eventAt(m_oldCut, inOld.start));
-    change.newShot = shotOf(m_newCut, eventAt(m_newCut, inNew.start));
-    change.shots = static_cast<std::int32_t>(piecesOf(m_oldCut, inOld).size());
+    change.oldShot = firstShotOf(m_oldCut, inOld);
+    change.newShot = firstShotOf(m_newCut, inNew);
+    change.shots = shotsIn(m_oldCut, inOld);
     return change;
 }
 

@@ -55,6 +55,8 @@ public:
         m_frames = &frames;
         for (std::size_t slot = 0; slot < m_slots.size(); ++slot)
             frames.set(slot, framesAtFirst(m_slots[slot]));
+        for (std::size_t reel = 0; reel < m_list.reels.size(); ++reel)
+            moveReel(reel);
         for (std::size_t slot = 0; slot < m_slots.size(); ++slot)
             carryOut(slot);
         m_frames = nullptr;
@@ -278,6 +280,29 @@ private:
         }
     }
 
+    /// Where it begins at another timecode now.
+    void moveReel(std::size_t reel)
+    {
+        const ReelChange& pair = m_list.reels[reel];
+        if (!pair.oldReel || !pair.newReel)
+            return;
+        const Reel& was = m_oldCut.reels()[*pair.oldReel];
+        const Reel& is = m_newCut.reels()[*pair.newReel];
+        if (was.timecodeStart == is.timecodeStart)
+            return;
+        PictureChange change;
+        change.kind = ChangeKind::ReelMoved;
+        change.frames = is.timecodeStart - was.timecodeStart;
+        change.inOld = {was.start, was.length};
+        change.inNew = {is.start, is.length};
+        NoteStep step;
+        step.action = StepAction::MoveReel;
+        step.place = {reel, 0};
+        step.from = step.place;
+        step.changes = {change};
+        m_list.rows[reel].emplace_back(std::move(step));
+    }
+
     NoteStep move(std::size_t block)
     {
         const KeptBlock& moved = m_blocks[block];
@@ -333,9 +358,11 @@ private:
             }
         }
         const std::vector<KeptStretch> doubled = doubledIn(step.inserted);
-        for (const KeptStretch& stretch : doubled)
-            step.doubledFrom.push_back(placeOfOld(stretch.oldStart));
         step.changes = m_changes.ofReplacing(step, surroundingsOf(step, nextKept), doubled);
+        for (const PictureChange& change : step.changes) {
+            if (change.kind == ChangeKind::Doubled)
+                step.doubledFrom.push_back(placeOfOld(change.inOld->start));
+        }
         for (const std::size_t slot : m_waiting)
             m_frames->set(slot, m_slots[slot].kind == Slot::Kind::Inserted ? m_slots[slot].frames.length : 0);
         m_list.rows[m_slots[m_waiting.front()].reel].emplace_back(std::move(step));

@@ -18,7 +18,8 @@ struct StepList {
 };
 
 /// Makes as few steps as possible that keep all picture of `kept`: between two kept stretches one, whatever is deleted and
-/// inserted there, and one for each block that is moved. What is deleted within a moved block moves along first.
+/// inserted there, and one for each block that is moved. What is deleted within a moved block moves along first. A reel that begins at another
+/// timecode is moved there by its first step.
 StepList makeSteps(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept);
 
 /// Joins steps that only trim and whose trims cancel out within `frames` frames into one step without a change of length,

@@ -58,7 +58,7 @@ StepPlaces::StepPlaces(const ChangeNotes& notes) : m_notes(notes), m_inOld(notes
                 addMove(entry, kept);
             else if (entry.step()->action == StepAction::Replace)
                 addReplace(entry, before, next[index]);
-            else
+            else if (entry.step()->action == StepAction::Relabel)
                 m_inOld[entry.number - 1].push_back(oldRange(*entry.step()->changes.front().inOld));
         }
     }

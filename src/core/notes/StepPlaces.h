@@ -31,6 +31,7 @@ public:
     /// The number of the step that moves the picture of this time of the old programme; 0 for none.
     std::size_t moveOf(double oldTime) const;
     /// Where the picture of a step was, from number 1 on: what it takes away or moves; of an insert the frames on both sides.
+    /// A step that moves a reel has none.
     const std::vector<SecondsRange>& inOld(std::size_t step) const { return m_inOld.at(step - 1); }
 
 private:

@@ -27,6 +27,7 @@ public:
     /// changes, in seconds of the project's clock. Throws what KeepPlanner throws.
     ProtectedRun(const DataModel& model, const std::vector<SecondsRange>& material, Source source);
 
+    Source source() const { return m_source; }
     const KeepPlan& plan() const { return m_plan; }
     bool needsRun() const { return m_bounds.has_value(); }
     /// What may change, in seconds of the project's clock. The run is needed.

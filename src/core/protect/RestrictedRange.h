@@ -15,18 +15,27 @@ public:
         : m_settings(settings), m_wasRestricted(settings.restrictRange()), m_former{settings.preserveMaterialBefore(),
                                                                                     settings.preserveMaterialAfter()}
     {
-        set(true, bounds);
+        set(m_settings, true, bounds);
     }
     RestrictedRange(const RestrictedRange&) = delete;
     RestrictedRange& operator=(const RestrictedRange&) = delete;
-    ~RestrictedRange() { set(m_wasRestricted, m_former); }
+    ~RestrictedRange() { set(m_settings, m_wasRestricted, m_former); }
+
+    bool isOf(const Settings& settings) const { return &settings == &m_settings; }
+    /// A copy of the settings as they will be afterwards.
+    Settings released() const
+    {
+        Settings settings = m_settings;
+        set(settings, m_wasRestricted, m_former);
+        return settings;
+    }
 
 private:
-    void set(bool isRestricted, const SecondsRange& range)
+    static void set(Settings& settings, bool isRestricted, const SecondsRange& range)
     {
-        m_settings.set(&Settings::restrictRange, isRestricted);
-        m_settings.set(&Settings::preserveMaterialBefore, range.start);
-        m_settings.set(&Settings::preserveMaterialAfter, range.end);
+        settings.set(&Settings::restrictRange, isRestricted);
+        settings.set(&Settings::preserveMaterialBefore, range.start);
+        settings.set(&Settings::preserveMaterialAfter, range.end);
     }
 
     Settings& m_settings;

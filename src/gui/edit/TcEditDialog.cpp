@@ -160,9 +160,17 @@ void TcEditDialog::confirm()
     if (!edit || !edit->canApply())
         return;
     const SafePointer<TcEditDialog> self(this);
+    if (!prepareChange() || !self || m_edit != edit)
+        return;
     edit->apply();
     if (self)
         close();
+}
+
+bool TcEditDialog::prepareChange()
+{
+    const bool isAsked = m_beforeChange && m_listKind == core::ListKind::Change && m_edit->isChanged();
+    return !isAsked || m_beforeChange();
 }
 
 void TcEditDialog::close()

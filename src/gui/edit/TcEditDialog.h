@@ -10,7 +10,9 @@
 
 #include <array>
 #include <cstdint>
+#include <functional>
 #include <memory>
+#include <utility>
 
 namespace cadrel::core {
 class EventList;
@@ -28,6 +30,9 @@ public:
     TcEditDialog();
     ~TcEditDialog() override;
 
+    /// Called before an event of the change EDL is changed, outside of the undo entry. When it returns false or throws, nothing
+    /// is changed.
+    void setBeforeChange(std::function<bool()> call) { m_beforeChange = std::move(call); }
     /// For events of the old and the new EDL: shows the motion speed, and one timecode can be changed alone. It counts from
     /// the next event on.
     void setSingleSelectionMode(bool flag);
@@ -60,8 +65,10 @@ private:
 
     void refresh();
     void refreshFlaw();
+    bool prepareChange();
     void close();
 
+    std::function<bool()> m_beforeChange;
     std::shared_ptr<EventEdit> m_edit; ///< null while the box is closed
     std::int32_t m_listKind = 0;
     bool m_singleSelectionMode = false;

@@ -221,9 +221,17 @@ void FileDialog::confirm()
     if (!taken)
         return;
     const SafePointer<FileDialog> self(this);
+    if (!prepareChange() || !self || m_taken != taken)
+        return;
     taken->appendTo(*m_model, offsetIn(m_destination.offset), offsetIn(m_source.offset), m_lastFolder);
     if (self)
         cancel();
+}
+
+bool FileDialog::prepareChange()
+{
+    const bool isAsked = m_beforeChange && m_listType == ListKind::Change && !m_taken->isEmpty();
+    return !isAsked || m_beforeChange();
 }
 
 // ---- Files ---------------------------------------------------------------------------------------------------------
@@ -247,7 +255,7 @@ void FileDialog::browse()
     std::vector<std::string> chosen;
     FileBrowserDialogBase::instance().browse(m_title.getText().toWideCharPointer(), m_lastFolder, L"edl",
                                              StringUtil::translate(L"Edit Decision List"), false, chosen);
-    if (self && !taken.expired())
+    if (self && !taken.expired() && !chosen.empty())
         takeFiles(chosen);
 }
 
@@ -257,8 +265,9 @@ void FileDialog::takeFiles(const std::vector<std::string>& paths)
     if (taken.expired() || !m_model)
         return;
     const SafePointer<FileDialog> self(this);
-    if (!paths.empty())
-        m_lastFolder = folderOfFile(StringUtil::toWide(paths.back()));
+    if (paths.empty())
+        return;
+    m_lastFolder = folderOfFile(StringUtil::toWide(paths.back()));
     takeEdls(taken, paths, m_model->settings().bRollRenaming());
     if (!self || taken.expired())
         return;

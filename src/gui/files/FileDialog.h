@@ -10,8 +10,10 @@
 #include "gui/sheet/SheetLabel.h"
 
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::core {
@@ -35,6 +37,9 @@ public:
     FileDialog();
     ~FileDialog() override;
 
+    /// Called before files are taken into the change EDL, outside of the undo entry. When it returns false or throws, nothing is
+    /// changed.
+    void setBeforeChange(std::function<bool()> call) { m_beforeChange = std::move(call); }
     void showForOldList() { showFor(core::ListKind::Old); }
     void showForNewList() { showFor(core::ListKind::New); }
     void showForChangeList() { showFor(core::ListKind::Change); }
@@ -87,10 +92,12 @@ private:
     void browse();
     void refresh();
     void keepInBounds(Side& side);
+    bool prepareChange();
     void showRange(Side& side, const juce::String& in, const juce::String& out);
     void reset();
     void setDropTarget(bool flag);
 
+    std::function<bool()> m_beforeChange;
     std::int32_t m_listType = NoList;
     core::DataModel* m_model = nullptr;
     std::shared_ptr<TakenFiles> m_taken; ///< null while the sheet is closed

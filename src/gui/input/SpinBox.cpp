@@ -97,6 +97,10 @@ void SpinBox::paintOverChildren(juce::Graphics& graphics)
     guardSystem([&] {
         if (hasKeyboardFocus(false))
             drawFocusRing(graphics, m_valueDisplay.getBounds().toFloat(), 0.0F);
+        if (isEnabled())
+            return;
+        graphics.setColour(juce::Colour(DisabledShade));
+        graphics.fillRect(m_backgroundColour.isOpaque() ? getLocalBounds() : m_valueDisplay.getBounds());
     });
 }
 
@@ -159,6 +163,7 @@ void SpinBox::enablementChanged()
         // JUCE doesn't expect that a listener deletes the input meanwhile, so nobody is told.
         if (!isEnabled() && m_valueDisplay.isBeingEdited())
             showValue();
+        repaint();
     });
 }
 

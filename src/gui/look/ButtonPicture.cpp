@@ -177,7 +177,7 @@ juce::Colour symbolColour(ButtonPicture::State state)
 {
     const juce::Colour dark(0xff1b1f24);
     if (!state.isEnabled)
-        return dark.withAlpha(DisabledOpacity);
+        return disabledInk();
     return state.isPressed ? dark.brighter(0.25F) : dark;
 }
 

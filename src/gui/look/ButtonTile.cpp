@@ -28,19 +28,29 @@ ButtonTile ButtonTile::lit(juce::Colour colour)
 
 void ButtonTile::draw(juce::Graphics& graphics, juce::Rectangle<float> area) const
 {
-    const float opacity = isEnabled ? 1.0F : DisabledOpacity;
     const juce::Rectangle<float> inner = area.reduced(1.0F);
-    graphics.setColour(juce::Colours::black.withAlpha(opacity));
-    graphics.fillRoundedRectangle(area, OuterCorner);
-    graphics.setGradientFill(juce::ColourGradient::vertical(top.withMultipliedAlpha(opacity), inner.getY(),
-                                                            bottom.withMultipliedAlpha(opacity), inner.getBottom()));
-    graphics.fillRoundedRectangle(inner, InnerCorner);
+    if (isEnabled) {
+        graphics.setColour(juce::Colours::black);
+        graphics.fillRoundedRectangle(area, OuterCorner);
+        graphics.setGradientFill(juce::ColourGradient::vertical(top, inner.getY(), bottom, inner.getBottom()));
+        graphics.fillRoundedRectangle(inner, InnerCorner);
+    } else {
+        graphics.setColour(toColour(Palette::frame).withAlpha(DisabledOpacity));
+        graphics.drawRoundedRectangle(area.reduced(0.5F), OuterCorner, 1.0F);
+        graphics.setColour(juce::Colours::black.withAlpha(DisabledOpacity));
+        graphics.fillRoundedRectangle(inner, InnerCorner);
+    }
     if (isOn) {
-        graphics.setColour(juce::Colours::black.withAlpha(opacity));
+        graphics.setColour(isEnabled ? juce::Colours::black : disabledInk());
         graphics.fillRect(inner.reduced(BarInset, 1.0F).removeFromBottom(BarHeight));
     }
     if (hasFocus)
         drawFocusRing(graphics, inner, InnerCorner);
+}
+
+juce::Colour disabledInk()
+{
+    return toColour(Palette::text).withAlpha(0.7F);
 }
 
 void drawFocusRing(juce::Graphics& graphics, juce::Rectangle<float> area, float cornerSize)

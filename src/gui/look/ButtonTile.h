@@ -6,7 +6,8 @@
 
 namespace cadrel::gui {
 
-/// The body of a button: black, with a rounded inner field that shades from top to bottom.
+/// The body of a button: black, with a rounded inner field that shades from top to bottom. That of a disabled button is flat and
+/// dark.
 struct ButtonTile {
     juce::Colour top;
     juce::Colour bottom;
@@ -24,6 +25,13 @@ struct ButtonTile {
 
 /// How much of the colour is left where a control is disabled.
 inline constexpr float DisabledOpacity = 0.5F;
+/// 1 for what is enabled.
+inline float opacityOf(const juce::Component& component)
+{
+    return component.isEnabled() ? 1.0F : DisabledOpacity;
+}
+/// The text or picture of a disabled button, which can still be read.
+juce::Colour disabledInk();
 /// What lies over a disabled input.
 inline constexpr juce::uint32 DisabledShade = 0x82606060;
 /// How much darker the lower end of a lit tile is, and the dimmed phase of a flashing button.

@@ -59,6 +59,7 @@ void LookAndFeel::setColours()
     setColour(juce::TextEditor::textColourId, white);
     setColour(juce::TextEditor::backgroundColourId, black);
     setColour(juce::TextEditor::focusedOutlineColourId, juce::Colours::transparentBlack);
+    setColour(juce::TextEditor::shadowColourId, juce::Colours::transparentBlack);
     setColour(juce::TextEditor::highlightColourId, selection);
     setColour(juce::TextEditor::highlightedTextColourId, black);
     setColour(juce::CaretComponent::caretColourId, selection);

@@ -45,7 +45,7 @@ public:
     void drawLabel(juce::Graphics& graphics, juce::Label& label) override;
     void drawProgressBar(juce::Graphics& graphics, juce::ProgressBar& bar, int width, int height, double progress,
                          const juce::String& text) override;
-    /// A disabled editor lies under a shade, unless what is beneath it shows.
+    /// A disabled editor lies under a shade. Where what is beneath it shows, only its outline is dimmed.
     void drawTextEditorOutline(juce::Graphics& graphics, int width, int height, juce::TextEditor& editor) override;
     void drawTableHeaderBackground(juce::Graphics& graphics, juce::TableHeaderComponent& header) override;
     /// An arrow after the name shows the direction that the table is sorted in.

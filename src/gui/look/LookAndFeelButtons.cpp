@@ -17,11 +17,6 @@ constexpr float Squeezing = 0.8F;
 constexpr float TickBoxX = 4.0F;
 constexpr int TextAfterTickBox = 5;
 
-float opacityOf(const juce::Component& component)
-{
-    return component.isEnabled() ? 1.0F : DisabledOpacity;
-}
-
 ButtonTile tileOf(const juce::Button& button, bool isDown)
 {
     if (isDown && !button.getClickingTogglesState())
@@ -67,7 +62,7 @@ void LookAndFeel::drawButtonText(juce::Graphics& graphics, juce::TextButton& but
     guardSystem([&] {
         const int colour =
             button.getToggleState() ? juce::TextButton::textColourOnId : juce::TextButton::textColourOffId;
-        graphics.setColour(button.findColour(colour).withMultipliedAlpha(opacityOf(button)));
+        graphics.setColour(button.isEnabled() ? button.findColour(colour) : disabledInk());
         graphics.setFont(getTextButtonFont(button, button.getHeight()));
         graphics.drawFittedText(button.getButtonText(), button.getLocalBounds().reduced(3, 0),
                                 juce::Justification::centred, 1, Squeezing);

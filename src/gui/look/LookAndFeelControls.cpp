@@ -65,7 +65,7 @@ void LookAndFeel::drawComboBox(juce::Graphics& graphics, int width, int height, 
 {
     guardSystem([&] {
         const juce::Rectangle<int> button(buttonX, buttonY, buttonWidth, buttonHeight);
-        const float opacity = box.isEnabled() ? 1.0F : DisabledOpacity;
+        const float opacity = opacityOf(box);
         const juce::Colour buttonColour = box.findColour(juce::ComboBox::buttonColourId).withMultipliedAlpha(opacity);
         graphics.fillAll(box.findColour(juce::ComboBox::backgroundColourId));
         graphics.setColour(isDown ? buttonColour.brighter(0.4F) : buttonColour);
@@ -74,13 +74,13 @@ void LookAndFeel::drawComboBox(juce::Graphics& graphics, int width, int height, 
         graphics.drawRect(0, 0, width, height);
         if (box.hasKeyboardFocus(false))
             drawFocusRing(graphics, juce::Rectangle<int>(width, height).toFloat(), 0.0F);
-        if (!box.isEnabled())
-            return;
         const auto at = [area = button.toFloat()](float x, float y) { return area.getRelativePoint(x, y); };
         juce::Path triangle;
         triangle.addTriangle(at(0.5F, 0.63F), at(0.8F, 0.33F), at(0.2F, 0.33F));
-        graphics.setColour(box.findColour(juce::ComboBox::arrowColourId));
+        graphics.setColour(box.findColour(juce::ComboBox::arrowColourId).withMultipliedAlpha(opacity));
         graphics.fillPath(triangle);
+        if (!box.isEnabled())
+            graphics.fillAll(juce::Colour(DisabledShade));
     });
 }
 
@@ -144,7 +144,7 @@ void LookAndFeel::drawPopupMenuItem(juce::Graphics& graphics, const juce::Rectan
 void LookAndFeel::drawLabel(juce::Graphics& graphics, juce::Label& label)
 {
     guardSystem([&] {
-        const float opacity = label.isEnabled() ? 1.0F : DisabledOpacity;
+        const float opacity = opacityOf(label);
         graphics.fillAll(label.findColour(juce::Label::backgroundColourId));
         if (!label.isBeingEdited()) {
             const auto box = getLabelBorderSize(label).subtractedFrom(label.getLocalBounds()).toFloat();
@@ -190,6 +190,11 @@ void LookAndFeel::drawTextEditorOutline(juce::Graphics& graphics, int width, int
             LookAndFeel_V2::drawTextEditorOutline(graphics, width, height, editor);
         else if (editor.findColour(juce::TextEditor::backgroundColourId).isOpaque())
             graphics.fillAll(juce::Colour(DisabledShade));
+        else {
+            graphics.setColour(
+                editor.findColour(juce::TextEditor::outlineColourId).withMultipliedAlpha(DisabledOpacity));
+            graphics.drawRect(0, 0, width, height);
+        }
     });
 }
 

@@ -9,7 +9,8 @@ namespace cadrel::gui {
 void PictureButton::setTooltip(const juce::String& tooltip)
 {
     Button::setTooltip(tooltip);
-    setTitle(tooltip);
+    if (getTitle().isEmpty())
+        setTitle(tooltip);
 }
 
 void PictureButton::paintButton(juce::Graphics& graphics, bool, bool isDown)

@@ -8,7 +8,7 @@
 
 namespace cadrel::gui {
 
-/// A button that shows a picture. Its tooltip is also its title, which screen readers read.
+/// A button that shows a picture. Screen readers read its title. Its first tooltip is also its title, unless it has one then.
 class PictureButton : public juce::Button {
 public:
     PictureButton(const juce::String& name, ButtonPicture::Symbol symbol) : Button(name), m_picture(symbol) {}

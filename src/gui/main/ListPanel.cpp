@@ -101,8 +101,9 @@ void ListPanel::show(core::DataModel& model, core::CadrelerBase* engine, EventTa
     if (!isNew)
         reload();
     m_model->setEngine(engine);
-    if (const auto key = StoredTable(model, m_listKind).sortKey())
-        m_model->applySort(key->column, key->forwards);
+    // Stored rows are counted in the stored order, or in that of the programme.
+    const SortKey key = StoredTable(model, m_listKind).sortKey().value_or(SortKey());
+    m_model->applySort(key.column, key.forwards);
     updateCounters();
 }
 

@@ -54,10 +54,15 @@ bool MainCommands::allows(MainButton button) const
     return obstacle(button) == nullptr;
 }
 
+std::wstring MainCommands::purpose(MainButton button)
+{
+    return translated(purposeOf(button));
+}
+
 std::wstring MainCommands::tooltip(MainButton button) const
 {
     const wchar_t* const reason = obstacle(button);
-    return translated(reason ? reason : purposeOf(button));
+    return reason ? translated(reason) : purpose(button);
 }
 
 const wchar_t* MainCommands::obstacle(MainButton button) const

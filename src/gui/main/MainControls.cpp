@@ -119,6 +119,32 @@ std::unique_ptr<juce::Button> makeButton(MainButton button)
     throw std::out_of_range("no such button");
 }
 
+/// The list that the picture of a button doesn't tell.
+std::optional<std::int32_t> listOf(MainButton button)
+{
+    switch (button) {
+    case MainButton::AddOld:
+    case MainButton::ClearOld:
+        return ListKind::Old;
+    case MainButton::AddNew:
+    case MainButton::ClearNew:
+        return ListKind::New;
+    case MainButton::AddChange:
+    case MainButton::ClearChange:
+        return ListKind::Change;
+    default:
+        return std::nullopt;
+    }
+}
+
+/// What a screen reader calls a button without a text.
+juce::String spokenNameOf(MainButton button)
+{
+    const juce::String purpose(MainCommands::purpose(button).c_str());
+    const std::optional<std::int32_t> listKind = listOf(button);
+    return listKind ? translatedText(titleOf(*listKind)) + ", " + purpose : purpose;
+}
+
 juce::Rectangle<int> toRectangle(const MainLayout::Box& box)
 {
     return {box.x, box.y, box.width, box.height};
@@ -145,8 +171,12 @@ MainControls::MainControls(FilesDropped filesDropped) : m_filesDropped(std::move
 
 void MainControls::makeButtons()
 {
-    for (std::size_t index = 0; index < m_buttons.size(); ++index)
-        m_buttons.at(index) = makeButton(static_cast<MainButton>(index));
+    for (std::size_t index = 0; index < m_buttons.size(); ++index) {
+        const auto which = static_cast<MainButton>(index);
+        m_buttons.at(index) = makeButton(which);
+        if (dynamic_cast<PictureButton*>(m_buttons.at(index).get()))
+            m_buttons.at(index)->setTitle(spokenNameOf(which));
+    }
 }
 
 /// The order in which the controls are drawn.
@@ -237,7 +267,7 @@ void MainControls::resized()
 
 void MainControls::enablementChanged()
 {
-    // The hints are dimmed.
+    // Titles and hints are dimmed.
     guardSystem([this] { repaint(); });
 }
 
@@ -260,7 +290,8 @@ void MainControls::paintPanel(juce::Graphics& graphics, std::int32_t listKind) c
     graphics.drawRoundedRectangle(panel, PanelCorner, FrameThickness);
     const MainLayout::Area title = places.title(listKind);
     drawText(graphics, translatedText(titleOf(listKind)), title.x, title.y, title.width, title.height,
-             juce::Justification::centred, getFont(TitleFont), toColour(Palette::frame), true);
+             juce::Justification::centred, getFont(TitleFont), toColour(Palette::frame).withAlpha(opacityOf(*this)),
+             true);
     if (listKind == ListKind::Change) {
         const MainLayout::Rule rule = places.rule();
         graphics.setColour(toColour(Palette::frame));
@@ -277,7 +308,7 @@ void MainControls::paintOverChildren(juce::Graphics& graphics)
             const juce::String& hint = m_hints.at(static_cast<std::size_t>(listKind));
             const juce::Rectangle<int> table = toRectangle(layout().table(listKind));
             if (!hint.isEmpty()) {
-                graphics.setColour(toColour(Palette::text).withAlpha(isEnabled() ? 1.0F : DisabledOpacity));
+                graphics.setColour(toColour(Palette::text).withAlpha(opacityOf(*this)));
                 graphics.setFont(getFont(HintFont));
                 graphics.drawFittedText(hint, table.reduced(HintMargin, HintMargin), juce::Justification::centred, 3);
             }

@@ -34,12 +34,16 @@ MainGui::MainGui()
 {
     setOpaque(true);
     setWantsKeyboardFocus(true);
+    // Clicks come to the window itself only beside a sheet, which keeps the keyboard.
+    setMouseClickGrabsKeyboardFocus(false);
     addAndMakeVisible(m_controls);
-    for (Sheet* const sheet :
-         std::initializer_list<Sheet*>{&m_settingsDialog, &m_videosDialog, &m_fileDialog, &m_editDialog}) {
+    for (Sheet* const sheet : sheets()) {
         sheet->setBeneath(&m_controls);
         addChildComponent(sheet);
     }
+    m_fileDialog.setBeforeChange([this] { return stopPreview(); });
+    m_editDialog.setBeforeChange([this] { return stopPreview(); });
+    m_controls.addComponentListener(this);
     m_settingsDialog.addComponentListener(this);
     m_fileDialog.addComponentListener(this);
     for (std::size_t index = 0; index < MainButtonCount; ++index)
@@ -53,6 +57,7 @@ MainGui::~MainGui()
     guardSystem([this] { stopPreview(); });
     if (m_notifier)
         m_notifier->removeListener(this);
+    m_controls.removeComponentListener(this);
     m_settingsDialog.removeComponentListener(this);
     m_fileDialog.removeComponentListener(this);
     closeSheets();
@@ -74,8 +79,9 @@ void MainGui::setNotifier(core::ChangeContextNotificationBase* notifier)
 
 void MainGui::setVideoSource(const std::shared_ptr<VideoProviderBase>& provider)
 {
+    // The tracks go with the last provider that has them.
+    guardSystem([&] { m_videosDialog.setTrackHandler(provider ? &provider->getTrackHandler() : nullptr); });
     guardSystem([&] { m_controls.video().setProvider(provider); });
-    m_videosDialog.setTrackHandler(provider ? &provider->getTrackHandler() : nullptr);
 }
 
 void MainGui::onChange(const core::ChangeContext& context)
@@ -105,8 +111,11 @@ void MainGui::resized()
 void MainGui::focusGained(FocusChangeType)
 {
     guardSystem([this] {
-        if (isEnabled() && m_controls.isEnabled())
-            m_controls.panel(ListKind::Change).table().grabKeyboardFocus();
+        focusChangeTable();
+        for (Sheet* const sheet : sheets()) {
+            if (sheet->isVisible())
+                sheet->takeFocus();
+        }
     });
 }
 
@@ -167,9 +176,18 @@ void MainGui::carryOut(MainButton button)
     }
 }
 
+void MainGui::componentEnablementChanged(juce::Component&)
+{
+    guardSystem([this] {
+        // The window got the keyboard when nothing in it could have it.
+        if (hasKeyboardFocus(false))
+            focusChangeTable();
+    });
+}
+
 void MainGui::componentVisibilityChanged(juce::Component& component)
 {
-    if (component.isVisible() || m_isModelChanging)
+    if (&component == &m_controls || component.isVisible() || m_isModelChanging)
         return;
     // A change of the VFX names, or a list that has come, counts at once.
     guardUser([this] {

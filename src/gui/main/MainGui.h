@@ -10,9 +10,11 @@
 #include "gui/settings/SettingsDialog.h"
 #include "gui/table/EventTableModel.h"
 #include "gui/video/NewVideosDialog.h"
+#include "util/Result.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
+#include <array>
 #include <cstdint>
 #include <functional>
 #include <memory>
@@ -29,6 +31,7 @@ class ProtectedRun;
 
 namespace cadrel::gui {
 
+class KeepQuestion;
 class VideoProviderBase;
 
 /// The window of Cadrel. It shows the model that its notifier names, asks the engine for what is to be done, and draws itself
@@ -71,6 +74,7 @@ private:
 
     void buttonClicked(juce::Button* button) override;
     void componentVisibilityChanged(juce::Component& component) override;
+    void componentEnablementChanged(juce::Component& component) override;
     void selectionChanged(EventTableModel& model) override;
     void sortChanged(EventTableModel& model) override;
     void editRequested(const std::shared_ptr<core::EventBase>& event, EventTableModel& model,
@@ -82,6 +86,8 @@ private:
     void handle(const core::ChangeContext& context);
     void setModel(core::DataModel* model);
     void closeSheets();
+    /// Empty where the host can't tell it.
+    std::wstring projectPath();
     void letGoOfModel();
     void showModel();
     void showList(std::int32_t listKind);
@@ -97,6 +103,7 @@ private:
     void showCommands();
     void actionEnded(const core::ActionChangeContext& end);
     void focusChangeTable();
+    std::array<Sheet*, 4> sheets() { return {&m_settingsDialog, &m_videosDialog, &m_fileDialog, &m_editDialog}; }
 
     // What the user asks for; in MainGuiCommands.cpp.
 
@@ -112,10 +119,18 @@ private:
         Kept,
         None, ///< there is no run
     };
-    /// Asks the user where there is something to ask. None also when everything has changed meanwhile.
-    Protection askForProtection();
+    /// Asks the user where there is something to ask, and again where that has changed meanwhile. The run becomes the one that he
+    /// was asked about. None also when no run can begin any more.
+    Protection askForProtection(core::ProtectedRun& run);
+    Protection answerTo(const KeepQuestion& question);
+    /// Whether the run goes on from where the sound stands, or the user wants it nevertheless.
+    bool mayRepeat();
+    /// The button that the user has pressed, counted from 1; 0 when no run can begin any more.
+    std::int32_t askBeforeRun(const std::wstring& question, const std::vector<const wchar_t*>& buttons);
     core::ProtectedRun plannedRun() const;
-    void requestRun(Protection protection);
+    void requestRun(Protection protection, const core::ProtectedRun& run);
+    util::Result::Type requestKeptRun(const core::ProtectedRun& run);
+    void noteRun();
     void switchPreview(bool isOn);
     /// False when the model is another one now.
     bool stopPreview();
@@ -134,7 +149,7 @@ private:
     core::ChangeContextNotificationBase* m_notifier = nullptr;
     core::DataModel* m_model = nullptr;
     bool m_isRunRequested = false; ///< until it has ended or was dropped
-    bool m_hadFocus = false;       ///< when the run was requested
+    bool m_hadFocus = false;       ///< when the user asked for the run
     bool m_isPreviewTold = false;  ///< the user knows why the preview that is on shows nothing
     bool m_isModelChanging = false;
     std::wstring m_saveFolder;

@@ -59,8 +59,7 @@ void MainGui::setModel(core::DataModel* model)
         letGoOfModel();
     }
     m_model = model;
-    guardSystem(
-        [this] { m_fileDialog.setModel(m_model, m_model && m_engine ? m_engine->getProjectName() : std::wstring()); });
+    guardSystem([this] { m_fileDialog.setModel(m_model, projectPath()); });
     guardSystem([this] { m_settingsDialog.setSettings(m_model ? &m_model->settings() : nullptr); });
     guardSystem([this] { showVideoList(); });
     if (m_model)
@@ -69,9 +68,18 @@ void MainGui::setModel(core::DataModel* model)
     updateEnablement();
 }
 
+std::wstring MainGui::projectPath()
+{
+    std::wstring path;
+    if (m_model && m_engine)
+        guardSystem([&] { path = m_engine->getProjectName(); });
+    return path;
+}
+
 /// What was begun isn't stored in a model that goes.
 void MainGui::closeSheets()
 {
+    guardSystem([] { juce::PopupMenu::dismissAllActiveMenus(); });
     guardSystem([this] {
         m_settingsDialog.setSettings(nullptr);
         m_settingsDialog.setVisible(false);
@@ -102,7 +110,7 @@ void MainGui::showModel()
     resized();
     for (const std::int32_t listKind : {ListKind::Change, ListKind::Old, ListKind::New}) {
         m_controls.panel(listKind).restoreSelection();
-        m_controls.panel(listKind).updateCounters();
+        m_controls.panel(listKind).updateSelected();
     }
     showSelection();
 }
@@ -204,7 +212,11 @@ void MainGui::showCommands()
     for (std::size_t index = 0; index < MainButtonCount; ++index) {
         const auto which = static_cast<MainButton>(index);
         juce::Button& button = m_controls.button(which);
-        button.setEnabled(commands.allows(which) || !m_model);
+        const bool isUsable = commands.allows(which) || !m_model;
+        // A button that is disabled loses the keyboard, and nobody gets it.
+        if (!isUsable && button.hasKeyboardFocus(true))
+            focusChangeTable();
+        button.setEnabled(isUsable);
         const juce::String tooltip(commands.tooltip(which).c_str());
         if (button.getTooltip() != tooltip)
             button.setTooltip(tooltip);
@@ -224,7 +236,9 @@ void MainGui::actionEnded(const ActionChangeContext& end)
         Guard::tell(told);
         return;
     }
-    if (hasKeyboardFocus(true))
+    // The keyboard was with the host's own windows, and has come back to nobody.
+    const bool isNobodys = !getCurrentlyFocusedComponent() && getPeer() && getPeer()->isFocused();
+    if (hasKeyboardFocus(true) || isNobodys)
         focusChangeTable();
     if (!std::exchange(m_isPreviewTold, m_isPreviewTold || !told.empty()))
         Guard::tell(told);

@@ -8,6 +8,7 @@
 #include "core/model/DataModelCommandCreator.h"
 #include "core/notify/ChangeContext.h"
 #include "core/protect/ProtectedRun.h"
+#include "core/protect/RunRecord.h"
 #include "core/time/Timecode.h"
 #include "gui/files/EdlFolder.h"
 #include "gui/guard/Guard.h"
@@ -17,6 +18,7 @@
 #include "gui/main/KeepQuestion.h"
 #include "gui/main/MainCommands.h"
 #include "gui/main/MainGui.h"
+#include "gui/main/RepeatQuestion.h"
 #include "gui/main/SavedChangeEdl.h"
 #include "gui/services/AlertWindowBase.h"
 #include "gui/services/FileBrowserDialogBase.h"
@@ -104,12 +106,18 @@ void MainGui::start()
         Guard::tell(EngineAnswers::ofReadiness(ready, ActionChangeContext::Run));
         return;
     }
+    m_hadFocus = hasKeyboardFocus(true);
+    const bool wasPreview = m_model->isPreviewActive();
     if (!stopPreview())
         return;
-    m_controls.setOn(MainButton::Source, true);
-    const Protection protection = askForProtection();
+    if (wasPreview)
+        m_controls.setOn(MainButton::Source, true);
+    if (!mayRepeat())
+        return;
+    core::ProtectedRun run = plannedRun();
+    const Protection protection = askForProtection(run);
     if (protection != Protection::None)
-        requestRun(protection);
+        requestRun(protection, run);
 }
 
 core::ProtectedRun MainGui::plannedRun() const
@@ -117,55 +125,101 @@ core::ProtectedRun MainGui::plannedRun() const
     return {*m_model, m_engine->getMaterial(), core::ProtectedRun::sourceOf(*m_model)};
 }
 
-MainGui::Protection MainGui::askForProtection()
+MainGui::Protection MainGui::askForProtection(core::ProtectedRun& run)
 {
-    const core::ProtectedRun run = plannedRun();
-    const KeepQuestion question(run, core::Timecode::framerate());
-    if (!question.isNeeded())
-        return Protection::Plain;
+    Protection answer = Protection::Plain;
+    std::wstring asked;
+    for (;;) {
+        const KeepQuestion question(run, core::Timecode::framerate());
+        const std::wstring text = question.text();
+        if (!question.isNeeded())
+            return Protection::Plain;
+        // The user has answered what is to be asked now.
+        if (text == asked)
+            return answer;
+        answer = answerTo(question);
+        if (answer == Protection::None)
+            return answer;
+        asked = text;
+        // List and material may have changed while he was asked.
+        run = plannedRun();
+    }
+}
+
+MainGui::Protection MainGui::answerTo(const KeepQuestion& question)
+{
     // The first button is the one that Return presses.
     using Answers = std::vector<std::pair<const wchar_t*, Protection>>;
     const Answers answers =
         question.canKeep()
             ? Answers{{L"Keep", Protection::Kept}, {L"Don't Keep", Protection::Plain}, {L"Cancel", Protection::None}}
             : Answers{{L"Cancel", Protection::None}, {L"Don't Keep", Protection::Plain}};
-    const juce::Component::SafePointer<MainGui> self(this);
-    const core::DataModel* const model = m_model;
-    const std::int32_t pressed = AlertWindowBase::instance().show(
-        question.text(), answers[0].first, answers[1].first, answers.size() > 2 ? answers[2].first : std::wstring());
-    const bool isSame = self && m_model == model && m_model && isEnabled() && m_controls.isEnabled();
-    if (!isSame || pressed < 1 || pressed > static_cast<std::int32_t>(answers.size()) ||
-        m_engine->canStart() != Result::Ok)
-        return Protection::None;
-    return answers[static_cast<std::size_t>(pressed) - 1].second;
+    std::vector<const wchar_t*> buttons;
+    for (const auto& [button, protection] : answers)
+        buttons.push_back(button);
+    const std::int32_t pressed = askBeforeRun(question.text(), buttons);
+    return pressed == 0 ? Protection::None : answers[static_cast<std::size_t>(pressed) - 1].second;
 }
 
-void MainGui::requestRun(Protection protection)
+bool MainGui::mayRepeat()
 {
-    const bool hadFocus = hasKeyboardFocus(true);
-    Result::Type answer = Result::Ok;
-    if (protection == Protection::Kept) {
-        // While the user was asked, the list may have changed.
-        const core::ProtectedRun run = plannedRun();
-        if (!run.needsRun()) {
-            Guard::tell(translated(L"Everything stands where the new cut has it. Nothing has to change."));
-            return;
-        }
-        {
-            const auto command = core::createDataModelCommand(translated(L"Keep Sound outside of the Change EDL"));
-            run.putStartableListInto(*m_model);
-        }
-        answer = m_engine->startCadrelWithin(run.bounds());
-    } else {
-        answer = m_engine->startCadrel();
+    const std::wstring question = RepeatQuestion::text(*m_model);
+    if (question.empty())
+        return true;
+    constexpr std::int32_t StartAnyway = 2;
+    return askBeforeRun(question, {L"Cancel", L"Start Anyway"}) == StartAnyway;
+}
+
+std::int32_t MainGui::askBeforeRun(const std::wstring& question, const std::vector<const wchar_t*>& buttons)
+{
+    const juce::Component::SafePointer<MainGui> self(this);
+    const core::DataModel* const model = m_model;
+    const std::int32_t pressed = AlertWindowBase::instance().show(question, buttons[0], buttons[1],
+                                                                  buttons.size() > 2 ? buttons[2] : std::wstring());
+    const bool isSame = self && m_model == model && m_model && isEnabled() && m_controls.isEnabled();
+    const bool isButton = pressed >= 1 && pressed <= static_cast<std::int32_t>(buttons.size());
+    return isSame && isButton && m_engine->canStart() == Result::Ok ? pressed : 0;
+}
+
+/// The sound stands in the new cut as it is.
+void MainGui::noteRun()
+{
+    const auto command = core::createDataModelCommand(translated(L"Apply Cadrel"));
+    core::RunRecord::addRun(*m_model, core::RunRecord::allowedBy(m_model->settings()));
+}
+
+void MainGui::requestRun(Protection protection, const core::ProtectedRun& run)
+{
+    const bool isKept = protection == Protection::Kept;
+    if (isKept && !run.needsRun()) {
+        noteRun();
+        Guard::tell(translated(L"Everything stands where the new cut has it. Nothing has to change."));
+        return;
     }
+    const Result::Type answer = isKept ? requestKeptRun(run) : m_engine->startCadrel();
     if (answer != Result::Ok) {
         Guard::tell(EngineAnswers::ofRequest(answer, ActionChangeContext::Run));
         return;
     }
     m_isRunRequested = true;
-    m_hadFocus = hadFocus;
     updateEnablement();
+}
+
+/// The run begins later. So the list changes only when there will be a run.
+Result::Type MainGui::requestKeptRun(const core::ProtectedRun& run)
+{
+    const Result::Type answer = m_engine->startCadrelWithin(run.bounds());
+    if (answer != Result::Ok || run.source() == core::ProtectedRun::Source::Given)
+        return answer;
+    try {
+        const auto command = core::createDataModelCommand(translated(L"Keep Sound outside of the Change EDL"));
+        run.putStartableListInto(*m_model);
+    } catch (...) {
+        // That drops what is requested.
+        m_engine->setPreviewActive(false);
+        throw;
+    }
+    return answer;
 }
 
 // ---- The preview ---------------------------------------------------------------------------------------------------

@@ -441,6 +441,7 @@ void SettingsDialog::refreshLimit(Limit& limit, double seconds, bool isAnother) 
         const SignedTimecode shown = shownTime(seconds);
         limit.input.setValue(shown.amount, shown.isPositive, juce::dontSendNotification);
     }
+    limit.label.setEnabled(m_settings->restrictRange());
     limit.input.setActive(m_settings->restrictRange());
 }
 

@@ -56,8 +56,12 @@ void Sheet::showOver()
         m_beneath->setInterceptsMouseClicks(false, false);
     }
     toFront(false);
-    if (!isShowing())
-        return;
+    if (isShowing())
+        takeFocus();
+}
+
+void Sheet::takeFocus()
+{
     Component* const first = firstFocus();
     (first ? first : this)->grabKeyboardFocus();
 }

@@ -18,6 +18,9 @@ public:
     /// It isn't owned, and may go before the sheet.
     void setBeneath(juce::Component* component) { m_beneath = component; }
 
+    /// Gives the keyboard to the first control of the sheet that wants it.
+    void takeFocus();
+
     void paint(juce::Graphics& graphics) override;
     bool keyPressed(const juce::KeyPress& key) override;
     void visibilityChanged() override;

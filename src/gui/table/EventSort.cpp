@@ -124,10 +124,11 @@ void sortEventRows(std::vector<EventRow>& rows, const SortKey& key)
         keys.emplace_back(held.back().get(), rows[row].position, row, key.column);
     }
 
-    if (key.forwards)
-        std::sort(keys.begin(), keys.end(), [](const RowKey& a, const RowKey& b) { return b < a; });
-    else
-        std::sort(keys.begin(), keys.end());
+    const auto isBefore = [&key](const RowKey& a, const RowKey& b) { return key.forwards ? b < a : a < b; };
+    // Most lists come in their order.
+    if (std::is_sorted(keys.begin(), keys.end(), isBefore))
+        return;
+    std::sort(keys.begin(), keys.end(), isBefore);
 
     std::vector<EventRow> sorted;
     sorted.reserve(rows.size());

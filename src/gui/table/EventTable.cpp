@@ -133,6 +133,16 @@ void EventTable::paintOverChildren(juce::Graphics& graphics)
         juce::TableListBox::paintOverChildren(graphics);
         if (hasKeyboardFocus(false))
             drawFocusRing(graphics, getLocalBounds().toFloat(), FocusCorner);
+        if (!isEnabled())
+            graphics.fillAll(findColour(backgroundColourId).withAlpha(DisabledOpacity));
+    });
+}
+
+void EventTable::enablementChanged()
+{
+    guardSystem([&] {
+        juce::TableListBox::enablementChanged();
+        repaint();
     });
 }
 

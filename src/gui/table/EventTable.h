@@ -21,6 +21,7 @@ public:
     void focusGained(FocusChangeType cause) override;
     void focusLost(FocusChangeType cause) override;
     void paintOverChildren(juce::Graphics& graphics) override;
+    void enablementChanged() override;
     /// The menu is closed. A key may have gone up while it had the keys.
     void menuClosed();
 

@@ -3,6 +3,7 @@
 #include "gui/timeline/EventTimeLineView.h"
 
 #include "gui/guard/Guard.h"
+#include "gui/look/ButtonTile.h"
 #include "gui/look/ShownText.h"
 #include "gui/look/Text.h"
 
@@ -106,6 +107,11 @@ void EventTimeLineView::resized()
     guardSystem([this] { forgetBlocks(); });
 }
 
+void EventTimeLineView::enablementChanged()
+{
+    guardSystem([this] { repaint(); });
+}
+
 void EventTimeLineView::forgetBlocks()
 {
     m_pixelScale = 0.0F;
@@ -127,8 +133,13 @@ void EventTimeLineView::paint(juce::Graphics& graphics)
         const float pixelScale = graphics.getInternalContext().getPhysicalPixelScaleFactor();
         if (m_pixelScale != pixelScale)
             placeBlocks(pixelScale);
+        const bool isDimmed = !isEnabled();
+        if (isDimmed)
+            graphics.beginTransparencyLayer(DisabledOpacity);
         paintLane(graphics, m_blocks[0], 0, pixelScale);
         paintLane(graphics, m_blocks[1], DestinationTop, pixelScale);
+        if (isDimmed)
+            graphics.endTransparencyLayer();
     });
 }
 

@@ -30,6 +30,7 @@ public:
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;
+    void enablementChanged() override;
 
 private:
     static constexpr std::size_t LaneCount = 2;

@@ -3,6 +3,7 @@
 #include "gui/video/VideoDisplay.h"
 
 #include "gui/guard/Guard.h"
+#include "gui/look/ButtonTile.h"
 #include "gui/look/Text.h"
 #include "gui/video/VideoFrames.h"
 
@@ -66,7 +67,11 @@ VideoDisplay::VideoDisplay()
     addPicture(m_newImage, m_newTimeLabel);
     m_oldImage.setTitle(m_resultHint.getTitle());
     m_newImage.setTitle(translatedText(L"The picture of the new edit version"));
+    // A label is read as its text.
+    m_oldTimeLabel.setDescription(m_oldImage.getTitle());
+    m_newTimeLabel.setDescription(m_newImage.getTitle());
     addAndMakeVisible(m_resultHint);
+    m_resultHint.setAccessible(false);
     setSize(DefaultWidth, DefaultHeight);
     const juce::Image image = placeholder();
     m_oldImage.setImage(image);
@@ -124,8 +129,7 @@ void VideoDisplay::imageChanged(std::size_t side)
     guardSystem([&] {
         if (!m_active || !m_provider)
             return;
-        juce::ImageComponent& shown = side == VideoProviderBase::NewSide ? m_newImage : m_oldImage;
-        shown.setImage(m_provider->getImage(side));
+        imageOf(side).setImage(m_provider->getImage(side));
     });
 }
 
@@ -133,10 +137,16 @@ void VideoDisplay::requestFrames()
 {
     if (!m_provider)
         return;
-    const auto shown = [this](const Timecode& time) { return m_lastFrame ? VideoFrames::lastBefore(time) : time; };
     m_provider->setLastFrame(m_lastFrame);
-    m_provider->setTime(VideoProviderBase::OldSide, shown(m_oldTime));
-    m_provider->setTime(VideoProviderBase::NewSide, shown(m_newTime));
+    requestFrame(VideoProviderBase::OldSide, m_oldTime);
+    requestFrame(VideoProviderBase::NewSide, m_newTime);
+}
+
+/// Where there is none, the former picture would be one of another time.
+void VideoDisplay::requestFrame(std::size_t side, const Timecode& time)
+{
+    if (!guardSystem([&] { m_provider->setTime(side, m_lastFrame ? VideoFrames::lastBefore(time) : time); }))
+        imageOf(side).setImage(placeholder());
 }
 
 void VideoDisplay::show()
@@ -180,6 +190,15 @@ void VideoDisplay::resized()
     });
 }
 
+void VideoDisplay::enablementChanged()
+{
+    guardSystem([this] {
+        for (juce::ImageComponent* const picture : {&m_oldImage, &m_newImage})
+            picture->setAlpha(opacityOf(*this));
+        repaint();
+    });
+}
+
 void VideoDisplay::parentHierarchyChanged()
 {
     guardSystem([this] { updatePictureSize(); });
@@ -204,7 +223,7 @@ void VideoDisplay::paint(juce::Graphics& graphics)
         graphics.drawRoundedRectangle(panel, CornerSize, OutlineThickness);
         const auto width = static_cast<float>(getWidth());
         drawText(graphics, translatedText(L"Video"), 0.0F, 2.0F, width, TitleHeight, juce::Justification::centred,
-                 getFont(TitleFont), toColour(Palette::frame), true);
+                 getFont(TitleFont), toColour(Palette::frame).withAlpha(opacityOf(*this)), true);
         graphics.setColour(toColour(Palette::band));
         graphics.fillRect(3, 22, getWidth() - 6, 35);
         paintBlock(graphics, blockAt(BlockTop), L"Result");
@@ -217,7 +236,8 @@ void VideoDisplay::paintBlock(juce::Graphics& graphics, juce::Rectangle<int> blo
     graphics.setColour(toColour(Palette::band));
     graphics.fillRect(block);
     drawText(graphics, translatedText(name), 0.0F, static_cast<float>(block.getY()), static_cast<float>(getWidth()),
-             TitleHeight, juce::Justification::centred, getFont(BlockFont), juce::Colours::black, true);
+             TitleHeight, juce::Justification::centred, getFont(BlockFont),
+             juce::Colours::black.withAlpha(opacityOf(*this)), true);
 }
 
 } // namespace cadrel::gui

@@ -19,19 +19,20 @@ public:
     VideoDisplay();
     ~VideoDisplay() override;
 
-    /// Null for none. It is asked for the pictures of the present times at once, and throws what it throws then.
+    /// Null for none. It is asked for the pictures of the present times at once.
     void setProvider(std::shared_ptr<VideoProviderBase> provider);
     /// Starts inactive. An active display shows the last pictures of the provider until newer ones come.
     void setActive(bool active);
     bool isActive() const { return m_active; }
     /// Shows the times, and asks for their pictures. With `lastFrame` they are OUT points, and the pictures are those of the
-    /// frames before them. Throws what Timecode::toSeconds and the provider throw.
+    /// frames before them. Where a picture can't be asked for, its placeholder shows.
     void setFrames(const core::Timecode& oldTime, const core::Timecode& newTime, bool lastFrame);
 
     void imageChanged(std::size_t side) override;
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;
+    void enablementChanged() override;
     /// The display may have come to a screen with another scale.
     void parentHierarchyChanged() override;
 
@@ -47,6 +48,11 @@ private:
     void paintBlock(juce::Graphics& graphics, juce::Rectangle<int> block, const wchar_t* name) const;
     void updatePictureSize();
     void requestFrames();
+    void requestFrame(std::size_t side, const core::Timecode& time);
+    juce::ImageComponent& imageOf(std::size_t side)
+    {
+        return side == VideoProviderBase::NewSide ? m_newImage : m_oldImage;
+    }
     void show();
     void showPlaceholders();
 

@@ -17,6 +17,7 @@ namespace {
 /// What a row keeps free beside its rule.
 constexpr int LeftEdge = 5;
 constexpr int BothEdges = 8;
+constexpr float SelectionOpacity = 0.35F;
 constexpr int NameFont = 5;
 constexpr int TimecodeFont = 7;
 constexpr float TextX = 18.0F;
@@ -158,11 +159,7 @@ void VideoListTableModel::showRows(const std::vector<std::string>& selected)
 {
     if (!m_table)
         return;
-    juce::SparseSet<int> rows;
-    for (const std::string& path : selected) {
-        if (const std::optional<std::size_t> row = m_rows.find(path))
-            rows.addRange(juce::Range<int>::withStartAndLength(static_cast<int>(*row), 1));
-    }
+    const juce::SparseSet<int> rows = rowsOf(selected);
     const Cell focused = focusedCell();
     m_table->updateContent();
     // The scroll bar may have come or gone.
@@ -172,13 +169,30 @@ void VideoListTableModel::showRows(const std::vector<std::string>& selected)
     keepFocus(focused);
 }
 
+/// JUCE's set takes gaps out of one range much faster than it takes many ranges in.
+juce::SparseSet<int> VideoListTableModel::rowsOf(const std::vector<std::string>& paths) const
+{
+    std::vector<int> rows;
+    for (const std::string& path : paths) {
+        if (const std::optional<std::size_t> row = m_rows.find(path))
+            rows.push_back(static_cast<int>(*row));
+    }
+    std::sort(rows.begin(), rows.end());
+    juce::SparseSet<int> set;
+    if (!rows.empty())
+        set.addRange({rows.front(), rows.back() + 1});
+    for (std::size_t index = 1; index < rows.size(); ++index)
+        set.removeRange({rows[index - 1] + 1, rows[index]});
+    return set;
+}
+
 std::vector<std::string> VideoListTableModel::selectedPaths() const
 {
     std::vector<std::string> paths;
-    for (int index = 0; m_table && index < m_table->getNumSelectedRows(); ++index) {
-        const auto row = static_cast<std::size_t>(m_table->getSelectedRow(index));
-        if (row < m_rows.count())
-            paths.push_back(m_rows.at(row).path);
+    const juce::SparseSet<int> selected = m_table ? m_table->getSelectedRows() : juce::SparseSet<int>();
+    for (const juce::Range<int>& range : selected.getRanges()) {
+        for (int row = range.getStart(); row < range.getEnd() && row < static_cast<int>(m_rows.count()); ++row)
+            paths.push_back(m_rows.at(static_cast<std::size_t>(row)).path);
     }
     return paths;
 }
@@ -283,6 +297,11 @@ std::unique_ptr<Input> VideoListTableModel::takeOrMake(juce::Component*& existin
 void VideoListTableModel::paintRowBackground(juce::Graphics& graphics, int row, int width, int height, bool isSelected)
 {
     guardSystem([&] {
+        if (isSelected) {
+            // Dark enough for the white digits of the start.
+            graphics.setColour(toColour(Palette::selection).withAlpha(SelectionOpacity));
+            graphics.fillRect(LeftEdge, 1, width - BothEdges, height - 1);
+        }
         if (row != 0) {
             graphics.setColour(toColour(Palette::band));
             graphics.drawHorizontalLine(0, static_cast<float>(LeftEdge), static_cast<float>(width - BothEdges));
@@ -297,10 +316,12 @@ void VideoListTableModel::paintRowBackground(juce::Graphics& graphics, int row, 
 void VideoListTableModel::paintCell(juce::Graphics& graphics, int row, int column, int width, int height, bool)
 {
     guardSystem([&] {
-        const std::wstring text = m_rows.text(static_cast<std::size_t>(row), column);
+        const auto index = static_cast<std::size_t>(row);
+        const std::wstring text = m_rows.text(index, column);
+        const bool isWarned = column == VideoColumn::Name && m_rows.at(index).isMissing;
         drawText(graphics, text.c_str(), TextX, 0.0F, static_cast<float>(width) - TextX, static_cast<float>(height),
                  juce::Justification::centredLeft, getFont(column == VideoColumn::Name ? NameFont : TimecodeFont),
-                 juce::Colours::white, true);
+                 isWarned ? toColour(Palette::orange) : juce::Colours::white, true);
     });
 }
 

@@ -67,6 +67,7 @@ private:
     void reload();
     /// Shows the rows after a change of their order.
     void showRows(const std::vector<std::string>& selected);
+    juce::SparseSet<int> rowsOf(const std::vector<std::string>& paths) const;
     std::vector<std::string> selectedPaths() const;
     Cell focusedCell() const;
     void keepFocus(const Cell& cell);

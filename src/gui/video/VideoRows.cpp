@@ -6,6 +6,7 @@
 #include "core/model/MediaPoolInterface.h"
 #include "core/model/VideoList.h"
 #include "gui/look/ShownText.h"
+#include "util/FilledText.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
 #include "util/Utf8Text.h"
@@ -13,8 +14,8 @@
 #include <algorithm>
 #include <cstdint>
 #include <limits>
-#include <set>
 #include <tuple>
+#include <unordered_set>
 #include <utility>
 
 namespace cadrel::gui {
@@ -86,22 +87,99 @@ const std::vector<VideoColumn>& VideoColumn::all()
     return columns;
 }
 
+/// The list of the new videos, in which many are looked for as VideoList::find does.
+class VideoRows::UsedVideos {
+public:
+    explicit UsedVideos(const VideoList& list) : m_list(list)
+    {
+        for (const Entry& entry : list.entries()) {
+            m_byPath.try_emplace(entry.path, &entry);
+            if (const auto name = fileNameOf(entry))
+                m_byFileName.try_emplace(*name, &entry);
+        }
+    }
+
+    /// Null for a video that isn't used. Throws what the string converter throws for a path that is no text.
+    const Entry* take(const std::string& path)
+    {
+        const Entry* entry = findIn(m_byPath, path);
+        if (!entry)
+            entry = findIn(m_byFileName, StringUtil::fileNameOf(StringUtil::toWide(path)));
+        if (entry)
+            m_taken.insert(entry);
+        return entry;
+    }
+    /// The rows of those that nobody has taken.
+    std::vector<Row> missingRows() const
+    {
+        std::vector<Row> rows;
+        for (const Entry& entry : m_list.entries()) {
+            if (std::optional<Row> row = m_taken.contains(&entry) ? std::nullopt : missingRow(entry))
+                rows.push_back(std::move(*row));
+        }
+        return rows;
+    }
+
+private:
+    /// Nothing without a project.
+    static std::optional<Row> missingRow(const Entry& entry)
+    {
+        try {
+            const auto name = fileNameOf(entry);
+            return Row{entry.path,
+                       name && !name->empty() ? StringUtil::toUtf8(*name) : entry.path,
+                       entry.start,
+                       entry.length,
+                       shownEnd(entry.start, entry.length),
+                       true,
+                       true};
+        } catch (Result::Type) {
+            return std::nullopt;
+        }
+    }
+    /// A stored path may be no text.
+    static std::optional<std::wstring> fileNameOf(const Entry& entry)
+    {
+        try {
+            return entry.fileName();
+        } catch (Result::Type) {
+            return std::nullopt;
+        }
+    }
+    template <class Map>
+    static const Entry* findIn(const Map& map, const typename Map::key_type& key)
+    {
+        const auto found = map.find(key);
+        return found == map.end() ? nullptr : found->second;
+    }
+
+    const VideoList& m_list;
+    std::unordered_map<std::string, const Entry*> m_byPath;
+    std::unordered_map<std::wstring, const Entry*> m_byFileName;
+    std::unordered_set<const Entry*> m_taken;
+};
+
 void VideoRows::refill()
 {
     std::vector<Row> rows;
-    std::set<std::string> paths;
-    const Timecode proposal = proposedStart();
-    const std::size_t videos = m_pool ? m_pool->count() : 0;
-    for (std::size_t index = 0; index < videos; ++index) {
-        std::optional<Row> row = readRow(index, proposal);
-        if (row && paths.insert(row->path).second)
-            rows.push_back(std::move(*row));
+    if (m_pool) {
+        UsedVideos used(m_list);
+        const Timecode proposal = proposedStart();
+        const std::size_t videos = m_pool->count();
+        for (std::size_t index = 0; index < videos; ++index) {
+            if (std::optional<Row> row = readRow(index, proposal, used))
+                rows.push_back(std::move(*row));
+        }
+        for (Row& row : used.missingRows())
+            rows.push_back(std::move(row));
     }
+    std::unordered_set<std::string> paths;
+    std::erase_if(rows, [&paths](const Row& row) { return !paths.insert(row.path).second; });
     m_rows = std::move(rows);
     sortRows();
 }
 
-std::optional<VideoRows::Row> VideoRows::readRow(std::size_t index, const Timecode& proposal) const
+std::optional<VideoRows::Row> VideoRows::readRow(std::size_t index, const Timecode& proposal, UsedVideos& used) const
 {
     try {
         Row row;
@@ -110,24 +188,18 @@ std::optional<VideoRows::Row> VideoRows::readRow(std::size_t index, const Timeco
         row.length = lengthOf(m_pool->getFrameCount(index));
         if (row.path.empty())
             return std::nullopt;
-        place(row, proposal);
+        if (const Entry* const entry = used.take(row.path)) {
+            row.isUsed = true;
+            row.start = entry->start;
+        } else {
+            const auto given = m_givenStarts.find(row.path);
+            row.start = given == m_givenStarts.end() ? proposal : given->second;
+        }
+        row.end = shownEnd(row.start, row.length);
         return row;
     } catch (Result::Type) {
         return std::nullopt;
     }
-}
-
-void VideoRows::place(Row& row, const Timecode& proposal) const
-{
-    const auto used = m_list.find(row.path);
-    row.isUsed = used != m_list.entries().end();
-    if (row.isUsed) {
-        row.start = used->start;
-    } else {
-        const auto given = m_givenStarts.find(row.path);
-        row.start = given == m_givenStarts.end() ? proposal : given->second;
-    }
-    row.end = shownEnd(row.start, row.length);
 }
 
 Timecode VideoRows::proposedStart() const
@@ -148,10 +220,8 @@ const VideoRows::Row& VideoRows::at(std::size_t row) const
 
 std::optional<std::size_t> VideoRows::find(const std::string& path) const
 {
-    const auto found = std::find_if(m_rows.begin(), m_rows.end(), [&](const Row& row) { return row.path == path; });
-    if (found == m_rows.end())
-        return std::nullopt;
-    return static_cast<std::size_t>(found - m_rows.begin());
+    const auto found = m_rowOf.find(path);
+    return found == m_rowOf.end() ? std::nullopt : std::optional(found->second);
 }
 
 std::wstring VideoRows::text(std::size_t row, int column) const
@@ -159,7 +229,8 @@ std::wstring VideoRows::text(std::size_t row, int column) const
     const Row& video = at(row);
     switch (column) {
     case VideoColumn::Name:
-        return util::toShownLine(video.name);
+        return video.isMissing ? util::filled(translated(L"Missing: %s"), util::toShownLine(video.name))
+                               : util::toShownLine(video.name);
     case VideoColumn::End:
         return util::toShownLine(video.end.toString());
     case VideoColumn::Length:
@@ -184,6 +255,9 @@ void VideoRows::sortRows()
             return m_sortForwards ? order > 0 : order < 0;
         return std::tie(a.name, a.path) < std::tie(b.name, b.path);
     });
+    m_rowOf.clear();
+    for (std::size_t row = 0; row < m_rows.size(); ++row)
+        m_rowOf.emplace(m_rows[row].path, row);
 }
 
 void VideoRows::setStart(const std::string& path, const Timecode& start)

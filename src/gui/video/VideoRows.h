@@ -8,6 +8,7 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 namespace cadrel::core {
@@ -31,16 +32,18 @@ struct VideoColumn {
 };
 
 /// The rows of the table of the new videos: each video of the media pool, with its place in the list of the new videos, or with
-/// a place that is proposed for it. A video is known by its path. The rows are always in their order.
+/// a place that is proposed for it. A video of the list that isn't in the pool any more has a row, too, until it is used no
+/// longer. A video is known by its path. The rows are always in their order.
 class VideoRows {
 public:
     struct Row {
         std::string path;
-        std::string name; ///< that it has in the pool
+        std::string name; ///< that it has in the pool, or that of its file
         core::Timecode start;
         core::Timecode length;
         core::Timecode end; ///< the last timecode of the day for a video that goes on beyond it
         bool isUsed = false;
+        bool isMissing = false; ///< from the pool
     };
 
     /// Neither is owned. It has no rows before `refill`, and none without a pool.
@@ -72,14 +75,16 @@ public:
     void setUsed(const std::string& path, bool isUsed);
 
 private:
-    std::optional<Row> readRow(std::size_t index, const core::Timecode& proposal) const;
-    void place(Row& row, const core::Timecode& proposal) const;
+    class UsedVideos;
+
+    std::optional<Row> readRow(std::size_t index, const core::Timecode& proposal, UsedVideos& used) const;
     core::Timecode proposedStart() const;
     void sortRows();
 
     core::VideoList& m_list;
     core::MediaPoolInterface* m_pool;
     std::vector<Row> m_rows;
+    std::unordered_map<std::string, std::size_t> m_rowOf; ///< by path
     double m_timeOrigin = 0.0;
     std::map<std::string, core::Timecode> m_givenStarts; ///< by path, of videos that aren't used
     int m_sortColumn = VideoColumn::Name;

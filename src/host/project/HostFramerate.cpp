@@ -24,4 +24,9 @@ core::Framerate framerateOf(const Velmark::FrameRateInfo& info)
     return framerate;
 }
 
+bool areSame(const core::Framerate& one, const core::Framerate& other)
+{
+    return one.rate == other.rate && one.dropFrame == other.dropFrame && one.pulledDown == other.pulledDown;
+}
+
 } // namespace cadrel::host

@@ -15,4 +15,7 @@ namespace cadrel::host {
 /// nominal rate other than 30.
 core::Framerate framerateOf(const Velmark::FrameRateInfo& info);
 
+/// Whether timecodes mean the same under both.
+bool areSame(const core::Framerate& one, const core::Framerate& other);
+
 } // namespace cadrel::host

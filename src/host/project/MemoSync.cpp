@@ -4,6 +4,7 @@
 
 #include "core/edl/EventBase.h"
 #include "host/border/HostFailure.h"
+#include "host/project/HostFramerate.h"
 #include "host/project/MemoMark.h"
 #include "host/project/MemoPlaces.h"
 #include "host/project/PlacedMemos.h"
@@ -47,6 +48,12 @@ struct Edited {
     bool place;
 };
 
+template <class Memo>
+Edited differencesOf(const Memo& one, const Memo& other)
+{
+    return {one.name != other.name, one.start != other.start || one.end != other.end};
+}
+
 /// Since it was marked. What isn't marked may have been edited in each way.
 Edited editedSinceMark(const HostEvent& copy)
 {
@@ -65,18 +72,25 @@ bool isValidUnder(const core::Framerate& framerate, const core::EventBase& event
 /// The new ids that are given to memos of a track one after the other.
 class NewIds {
 public:
-    explicit NewIds(const Track& memos) : m_memos(memos) {}
+    /// They are above all that are on the track and above `taken`.
+    NewIds(const Track& memos, std::int64_t taken) : m_memos(memos), m_taken(taken) {}
 
     std::int64_t next()
     {
-        if (m_last == std::numeric_limits<std::int64_t>::max())
-            throw util::Result::OutOfRange;
-        m_last = m_last ? *m_last + 1 : m_memos.nextUserId();
+        m_last = m_last ? idAfter(*m_last) : std::max(m_memos.nextUserId(), idAfter(m_taken));
         return *m_last;
     }
 
 private:
+    static std::int64_t idAfter(std::int64_t id)
+    {
+        if (id == std::numeric_limits<std::int64_t>::max())
+            throw util::Result::OutOfRange;
+        return id + 1;
+    }
+
     const Track& m_memos;
+    std::int64_t m_taken;
     std::optional<std::int64_t> m_last;
 };
 
@@ -90,6 +104,21 @@ double MemoSync::Stretch::clamped(double sourceTime) const
 double MemoSync::Stretch::toSource(double previewTime) const
 {
     return clamped(previewTime - preview.start + source.start);
+}
+
+//     copy     preview  |=== material ===|--- nothing ---|
+//                                            |-- loud --|
+//     memo     source   |================|
+//                             |-- loud --|
+SecondsRange MemoSync::Stretch::toSource(const SecondsRange& copy) const
+{
+    const SecondsRange memo{toSource(copy.start), toSource(copy.end)};
+    return isBefore(memo.start, memo.end) ? memo : SecondsRange{clamped(memo.end - (copy.end - copy.start)), memo.end};
+}
+
+bool MemoSync::Stretch::isSlower() const
+{
+    return isBefore(source.end - source.start, preview.end - preview.start);
 }
 
 //     event i           preview  |=================|
@@ -211,7 +240,7 @@ class MemoSync::Following {
 public:
     Following(const MemoSync& sync, const Track& memos, const Preview& preview, IEditTransaction& transaction)
         : m_sync(sync), m_memos(memos), m_preview(preview), m_adrift(idsOf(preview.adrift)), m_transaction(transaction),
-          m_newIds(memos)
+          m_newIds(memos, sync.m_knownIds.empty() ? 0 : *sync.m_knownIds.rbegin())
     {
     }
 
@@ -222,54 +251,119 @@ public:
             if (isBefore(memo.span.start, previewStart))
                 ++m_counts[memo.id];
         }
-        for (const Shown& shown : m_preview.shown) {
+        std::vector<Edits> edits;
+        for (const Shown& shown : m_preview.shown)
+            edits.push_back(editsOf(shown, m_sync.rememberedOf(shown)));
+        findTaken(edits, placed, previewStart);
+        for (std::size_t index = 0; index < edits.size(); ++index) {
+            const Shown& shown = m_preview.shown[index];
             if (hasChanged(shown.stretch.source)) {
                 placed = PlacedMemos(m_memos);
                 m_changed = CoveredRanges();
             }
-            followStretch(placed, shown, m_sync.rememberedOf(shown));
+            followStretch(placed, shown, edits[index]);
         }
     }
 
 private:
-    void followStretch(const PlacedMemos& placed, const Shown& shown, const Remembered* remembered)
+    /// What the user has done to the copies of a stretch.
+    struct Edits {
+        const Remembered* remembered; ///< null where nothing is known; then the rest is empty
+        CopiesThatWere gone;
+        std::vector<PlacedMemo> untouched;
+        std::vector<PlacedMemo> edited;
+    };
+    /// A copy that has left its stretch, as it was, and its memo: of several of its id the nearest to where the copy was.
+    struct Taken {
+        Memo before;
+        PlacedMemo memo;
+        double distance; ///< in seconds
+    };
+
+    static Edits editsOf(const Shown& shown, const Remembered* remembered)
     {
-        MemosById sources(sourcesOf(placed, shown, remembered != nullptr), shown.stretch.source);
-        if (remembered)
-            followEdits(shown, sources, *remembered);
+        static const Remembered NoCopies;
+        Edits edits{remembered, CopiesThatWere(remembered ? *remembered : NoCopies), {}, {}};
+        if (!remembered)
+            return edits;
+        for (const PlacedMemo& copy : shown.copies)
+            (edits.gone.isStillThere(memoOf(copy.event)) ? edits.untouched : edits.edited).push_back(copy);
+        edits.gone.settle();
+        return edits;
+    }
+
+    /// Finds the memos that go with their copies to the source of another stretch. Of each id one copy has gone from a stretch
+    /// and one has come to a stretch.
+    void findTaken(const std::vector<Edits>& edits, const PlacedMemos& placed, double previewStart)
+    {
+        std::map<std::int64_t, int> goneCounts;
+        std::map<std::int64_t, int> editedCounts;
+        for (const Edits& each : edits) {
+            for (const Memo& copy : each.gone.rest())
+                ++goneCounts[copy.id];
+            for (const PlacedMemo& copy : each.edited)
+                editedCounts[copy.id] += m_sync.m_notFollowed.contains(memoOf(copy.event)) ? 0 : 1;
+        }
+        std::map<std::int64_t, std::pair<Memo, const Stretch*>> left;
+        for (std::size_t index = 0; index < edits.size(); ++index) {
+            for (const Memo& copy : edits[index].gone.rest()) {
+                if (goneCounts[copy.id] == 1 && editedCounts[copy.id] == 1)
+                    left.try_emplace(copy.id, copy, &m_preview.shown[index].stretch);
+            }
+        }
+        if (left.empty())
+            return;
+        for (const PlacedMemo& memo : placed.all()) {
+            const auto found = left.find(memo.id);
+            if (found == left.end() || !isBefore(memo.span.start, previewStart))
+                continue;
+            const auto& [before, stretch] = found->second;
+            if (!liesIn(memo.span, stretch->source))
+                continue;
+            const double distance = std::abs(memo.span.start - stretch->toSource(before.start));
+            const auto [taken, isFirst] = m_taken.try_emplace(memo.id, Taken{before, memo, distance});
+            if (!isFirst && distance < taken->second.distance)
+                taken->second = {before, memo, distance};
+        }
+    }
+
+    void followStretch(const PlacedMemos& placed, const Shown& shown, Edits& edits)
+    {
+        MemosById sources(sourcesOf(placed, shown, edits.remembered), shown.stretch.source);
+        if (edits.remembered)
+            followEdits(shown.stretch, sources, edits);
         else
             compare(shown, sources);
     }
 
     /// Several memos may have the same id, as attributes travel with what is pasted. Then each follows the copy that stood
     /// where the memo is shown.
-    void followEdits(const Shown& shown, MemosById& sources, const Remembered& remembered)
+    void followEdits(const Stretch& stretch, MemosById& sources, Edits& edits)
     {
-        const Stretch& stretch = shown.stretch;
         // Another copy of the same memo may have been edited, or the memo itself.
-        CopiesThatWere gone(remembered);
-        std::vector<PlacedMemo> edited = shown.copies;
-        std::erase_if(edited, [&](const PlacedMemo& copy) {
-            const bool isUntouched = gone.isStillThere(memoOf(copy.event));
-            if (isUntouched)
-                sources.take(copy.id, stretch.toSource(copy.span.start));
-            return isUntouched;
-        });
-        gone.settle();
-        std::erase_if(edited, [&](const PlacedMemo& copy) {
-            const std::optional<Memo> before = gone.take(memoOf(copy.event));
-            return (before || hasOneMemo(copy)) && carryOver(copy, sources, stretch, before);
+        for (const PlacedMemo& copy : edits.untouched)
+            sources.take(copy.id, stretch.toSource(copy.span.start));
+        CopiesThatWere& gone = edits.gone;
+        std::erase_if(edits.edited, [&](const PlacedMemo& copy) {
+            // One that was there already isn't another that has gone since.
+            const Memo now = memoOf(copy.event);
+            if (m_sync.m_notFollowed.contains(now))
+                return hasOneMemo(copy) && carryOver(copy, sources, stretch, std::nullopt);
+            const auto before = gone.take(now);
+            return (before || hasOneMemo(copy)) ? carryOver(copy, sources, stretch, before) : takeAlong(copy, stretch);
         });
         // What the user has written in the real programme meanwhile has no copy that he could have removed, and the memos of
         // those adrift stay.
         for (const Memo& removed : gone.rest()) {
-            if (m_adrift.contains(removed.id))
+            if (m_adrift.contains(removed.id) || m_taken.contains(removed.id))
                 continue;
             if (const auto memo = sources.take(removed.id, stretch.toSource(removed.start)))
                 remove(*memo);
         }
-        for (const PlacedMemo& copy : edited)
-            writeMemoOf(copy, stretch);
+        for (const PlacedMemo& copy : edits.edited) {
+            if (!isLeftOfRemoved(copy))
+                writeMemoOf(copy, stretch);
+        }
     }
 
     /// As long as nothing is known of what the user has done, the numbers tell whether he has removed or written something.
@@ -301,16 +395,34 @@ private:
                MemoMark::keptBy(*copy.event.node()); // what was pasted from the real programme has none
     }
 
-    /// The memos that a stretch shows.
-    static std::vector<PlacedMemo> sourcesOf(const PlacedMemos& memos, const Shown& shown, bool isKnown)
+    /// Whether the user has removed the memo of a copy that he had edited before, while nobody followed. It comes back only
+    /// if he edits the copy again.
+    bool isLeftOfRemoved(const PlacedMemo& copy) const
+    {
+        return !m_counts.contains(copy.id) && MemoMark::keptBy(*copy.event.node()) &&
+               m_sync.m_notFollowed.contains(memoOf(copy.event));
+    }
+
+    /// The memos that a stretch shows. What was there is null where that isn't known.
+    static std::vector<PlacedMemo> sourcesOf(const PlacedMemos& memos, const Shown& shown, const Remembered* remembered)
     {
         const Stretch& stretch = shown.stretch;
         std::vector<PlacedMemo> found;
         std::vector<PlacedMemo> reaching;
-        memos.visitTouching(stretch.source, [&](const PlacedMemo& memo) {
+        const auto wasHere = [remembered](const PlacedMemo& memo) {
+            if (!remembered)
+                return false;
+            const auto copy = remembered->copies.lower_bound(firstOf(memo.id));
+            return copy != remembered->copies.end() && copy->id == memo.id;
+        };
+        // The memo of a copy that stands where nothing is left of the source stands at its end.
+        const double end = stretch.source.end + (stretch.isSlower() ? 2.0 * core::SameInstant : 0.0);
+        memos.visitTouching({stretch.source.start, end}, [&](const PlacedMemo& memo) {
             if (liesIn(memo.span, stretch.source))
                 found.push_back(memo);
-            else if (reachesInto(memo.span, stretch.source))
+            else if (!isBefore(memo.span.start, stretch.source.end) && wasHere(memo))
+                found.push_back(memo);
+            else if (reachesInto(memo.span, stretch.source) || !isBefore(memo.span.start, stretch.source.end))
                 reaching.push_back(memo);
         });
         if (reaching.empty())
@@ -319,7 +431,7 @@ private:
         const std::set<std::int64_t> copied = idsOf(shown.copies);
         std::set<std::int64_t> taken = idsOf(found);
         for (PlacedMemo& memo : reaching) {
-            if (copied.contains(memo.id) && (isKnown || taken.insert(memo.id).second))
+            if (copied.contains(memo.id) && (remembered || taken.insert(memo.id).second))
                 found.push_back(std::move(memo));
         }
         return found;
@@ -338,6 +450,21 @@ private:
         return memo.has_value();
     }
 
+    /// Whether the copy has come from another stretch, with its memo.
+    bool takeAlong(const PlacedMemo& copy, const Stretch& stretch)
+    {
+        const auto taken = m_taken.find(copy.id);
+        if (taken == m_taken.end() || !MemoMark::keptBy(*copy.event.node()))
+            return false;
+        auto& [before, memo, distance] = taken->second;
+        const Memo edited = memoOf(copy.event);
+        if (edited.name != before.name)
+            memo.event.setName(m_transaction, edited.name);
+        place(memo, stretch.toSource(copy.span));
+        markFollowed(copy.event);
+        return true;
+    }
+
     void carryOver(const HostEvent& copy, PlacedMemo& placed, const Stretch& stretch, const std::optional<Memo>& before)
     {
         HostEvent& memo = placed.event;
@@ -349,32 +476,34 @@ private:
             return;
 
         // What hangs over an edge of the stretch isn't in the preview, and stays.
-        const auto followed = [&stretch](double own, double inPreview) {
-            const double mapped = stretch.toSource(inPreview);
+        const auto followed = [&stretch](double own, double mapped) {
             return std::abs(stretch.clamped(own) - mapped) < core::SameInstant ? own : mapped;
         };
         const auto [ownStart, ownEnd] = placed.span;
-        const double start = followed(ownStart, edited.start);
-        const double end = followed(ownEnd, edited.end);
-        if (start == ownStart && (!memo.isRange() || end == ownEnd))
-            return;
-        noteChange(placed.span);
-        memo.setStart(m_transaction, start);
-        if (memo.isRange())
-            memo.setLength(m_transaction, end - start);
-        noteChange({start, std::max(start, memo.getEnd())});
+        const SecondsRange mapped = stretch.toSource(SecondsRange{edited.start, edited.end});
+        const double start = followed(ownStart, mapped.start);
+        const double end = followed(ownEnd, mapped.end);
+        if (start != ownStart || (memo.isRange() && end != ownEnd))
+            place(placed, {start, end});
     }
 
-    static Edited differencesOf(const Memo& one, const Memo& other)
+    void place(const PlacedMemo& placed, const SecondsRange& span)
     {
-        return {one.name != other.name, one.start != other.start || one.end != other.end};
+        HostEvent memo = placed.event;
+        noteChange(placed.span);
+        memo.setStart(m_transaction, span.start);
+        if (memo.isRange())
+            memo.setLength(m_transaction, span.end - span.start);
+        noteChange({span.start, std::max(span.start, memo.getEnd())});
     }
+
     /// What was done to the memo itself is the later edit.
     Edited editedWhereUnknown(const HostEvent& copy, const Memo& memo) const
     {
         Edited edited = editedSinceMark(copy);
-        if (const auto before = m_sync.m_behind.find(memo.id); before != m_sync.m_behind.end()) {
-            const Edited later = differencesOf(memo, before->second);
+        if (const auto last = m_sync.m_behind.find(memo.id); last != m_sync.m_behind.end()) {
+            const Behind now = laterThan(last->second, {memo, memo, {memoOf(copy)}});
+            const Edited later = differencesOf(memo, now.before);
             edited = {edited.name && !later.name, edited.place && !later.place};
         }
         return edited;
@@ -384,7 +513,7 @@ private:
     {
         HostEvent copy = written.event;
         copy.setUserId(m_newIds.next());
-        const SecondsRange span{stretch.toSource(copy.getStart()), stretch.toSource(copy.getEnd())};
+        const SecondsRange span = stretch.toSource(written.span);
         noteChange(span);
         Marker{span.start, span.end, copy.getName(), {}, copy.getUserId()}.insertInto(m_sync.m_hostContext,
                                                                                       m_transaction, m_memos);
@@ -413,6 +542,7 @@ private:
     const Track& m_memos;
     const Preview& m_preview;
     std::set<std::int64_t> m_adrift;
+    std::map<std::int64_t, Taken> m_taken;        ///< by their ids
     std::map<std::int64_t, std::size_t> m_counts; ///< of the memos in the real programme, by their ids
     IEditTransaction& m_transaction;
     NewIds m_newIds;
@@ -421,14 +551,17 @@ private:
 
 void MemoSync::forget()
 {
-    m_remembered.clear();
-    m_knownIds.clear();
+    forgetCopies({});
     m_behind.clear();
+    m_wereBehind.clear();
 }
 
 void MemoSync::forgetCopies(const Events& events)
 {
-    forget();
+    m_noted.reset();
+    m_remembered.clear();
+    m_knownIds.clear();
+    m_notFollowed.clear();
     for (const auto& event : events)
         m_remembered.try_emplace(event);
 }
@@ -436,32 +569,72 @@ void MemoSync::forgetCopies(const Events& events)
 void MemoSync::remember(const Track& memos, const Previewed& previewed)
 {
     // What is known in part would look as if the user had written the rest.
+    const auto lastBehind = std::exchange(m_behind, {});
     forgetCopies(previewed.events);
-    const PlacedMemos placed(memos);
+    if (memos.isAlive())
+        note(PlacedMemos(memos), memos, previewed, lastBehind);
+    m_noted = Noted{Velmark::Counted<Velmark::ITrackNode>::share(memos.node()), previewed.events, previewed.framerate,
+                    timesOf(previewed)};
+}
+
+void MemoSync::note(const PlacedMemos& placed, const Track& memos, const Previewed& previewed,
+                    const std::map<std::int64_t, Behind>& lastBehind)
+{
     if (placed.all().empty())
         return;
     auto found = m_remembered;
     std::set<std::int64_t> ids;
-    std::set<std::int64_t> editedIds;
+    std::set<Memo> notFollowed;
+    std::map<std::int64_t, std::set<Memo>> ahead;
     const Preview preview = previewOf(placed, previewed);
     const auto edited = editedSince(memos, preview.shown);
     for (const Shown& shown : preview.shown) {
         for (const PlacedMemo& copy : shown.copies) {
+            const Memo memo = memoOf(copy.event);
             if (edited.contains(copy.event.node())) {
-                editedIds.insert(copy.id);
+                notFollowed.insert(memo);
+                // What was written there has no memo yet.
+                if (MemoMark::keptBy(*copy.event.node()))
+                    ahead[copy.id].insert(memo);
                 continue;
             }
-            found[shown.event][shown.piece].copies.insert(memoOf(copy.event));
+            found[shown.event][shown.piece].copies.insert(memo);
             ids.insert(copy.id);
         }
     }
-    m_behind = onlyOnes(placed, previewed.offset + previewed.moved, editedIds);
+    for (const auto& [id, memo] : onlyOnes(placed, previewed.offset + previewed.moved, ahead)) {
+        Behind behind{memo, memo, ahead.at(id)};
+        if (const auto last = lastBehind.find(id); last != lastBehind.end())
+            behind = laterThan(last->second, std::move(behind));
+        // An undo or redo brings back what was.
+        behind.before = m_wereBehind.try_emplace({memo, behind.copies}, behind.before).first->second;
+        m_behind.emplace(id, std::move(behind));
+    }
+    m_notFollowed = std::move(notFollowed);
     m_remembered = std::move(found);
     m_knownIds = std::move(ids);
 }
 
+MemoSync::Behind MemoSync::laterThan(const Behind& last, Behind now)
+{
+    const auto isNew = [&last](const Memo& copy, bool Edited::*side) {
+        return std::ranges::all_of(last.copies, [&](const Memo& other) { return differencesOf(copy, other).*side; });
+    };
+    const auto isEdited = [&](bool Edited::*side) {
+        return !(differencesOf(now.memo, last.memo).*side) &&
+               std::ranges::any_of(now.copies, [&](const Memo& copy) { return isNew(copy, side); });
+    };
+    if (!isEdited(&Edited::name))
+        now.before.name = last.before.name;
+    if (!isEdited(&Edited::place)) {
+        now.before.start = last.before.start;
+        now.before.end = last.before.end;
+    }
+    return now;
+}
+
 std::map<std::int64_t, MemoSync::Memo> MemoSync::onlyOnes(const PlacedMemos& memos, double end,
-                                                          const std::set<std::int64_t>& ids)
+                                                          const std::map<std::int64_t, std::set<Memo>>& ids)
 {
     std::map<std::int64_t, Memo> found;
     std::set<std::int64_t> shared;
@@ -526,6 +699,17 @@ void MemoSync::follow(const Track& memos, const Previewed& previewed, IEditTrans
         return;
     const Preview preview = previewOf(placed, previewed);
     Following(*this, memos, preview, transaction).follow(std::move(placed), previewed.offset + previewed.moved);
+}
+
+bool MemoSync::hasNoted(const Track& memos, const Previewed& previewed) const
+{
+    return m_noted && m_noted->track.get() == memos.node() && m_noted->events == previewed.events &&
+           areSame(m_noted->framerate, previewed.framerate) && m_noted->times == timesOf(previewed);
+}
+
+std::array<double, 3> MemoSync::timesOf(const Previewed& previewed)
+{
+    return {previewed.offset, previewed.begin, previewed.moved};
 }
 
 const MemoSync::Remembered* MemoSync::rememberedOf(const Shown& shown) const

@@ -6,13 +6,18 @@
 #include "core/time/SecondsRange.h"
 #include "host/project/PreviewRecord.h"
 #include "host/track/HostEvent.h"
+#include "velmark/Counted.h"
+#include "velmark/Tracks.h"
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <optional>
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace Velmark {
@@ -33,8 +38,8 @@ class Track;
 
 /// Lets the memos of the real programme follow what the user does to their copies in the preview stretch. A memo and its
 /// copy have the same user id. What the user doesn't touch stays as it is, also where two events show the same memo. A copy
-/// that is taken over an edge of its stretch is followed to the edge; one that is taken out of all stretches leaves its memo
-/// as it was.
+/// that is taken over an edge of its stretch is followed to the edge, and a range that is taken past what the old cut has of
+/// a slower event ends there and keeps its length; one that is taken out of all stretches leaves its memo as it was.
 class MemoSync {
 public:
     using Events = std::vector<std::shared_ptr<core::EventBase>>;
@@ -56,12 +61,14 @@ public:
     /// Throws Result::HostObjectMissing and Result::HostCallFailed.
     void follow(const Track& memos, const Previewed& previewed, Velmark::IEditTransaction& transaction);
     /// Notes the copies as they are. To be done whenever they may have changed, by the user, an undo or otherwise. One that
-    /// was edited and that its memo hasn't followed isn't noted, so that it is followed the next time. After a failure nothing
-    /// is noted.
+    /// was edited and that its memo hasn't followed is followed the next time. But if the user has removed the memo by then, it
+    /// is written anew only once he edits the copy again. After a failure nothing is noted.
     void remember(const Track& memos, const Previewed& previewed);
+    /// Whether the last note was of that track and of that preview. It holds for as long as nothing on the track changes.
+    bool hasNoted(const Track& memos, const Previewed& previewed) const;
     /// From now on the copies are compared with their memos, and their number tells what the user has removed or written.
     void forget();
-    /// The same, but none counts as removed.
+    /// The same, but none counts as removed. What is known of memos that haven't followed stays for the next note.
     void forgetCopies(const Events& events);
     /// Notes on a copy what it is like now. To be done when it is written.
     static void markFollowed(const HostEvent& copy);
@@ -81,6 +88,10 @@ private:
 
         double clamped(double sourceTime) const;
         double toSource(double previewTime) const;
+        /// Where the memo of a copy stands.
+        core::SecondsRange toSource(const core::SecondsRange& copy) const;
+        /// Whether the preview goes on where nothing is left of the source.
+        bool isSlower() const;
     };
     struct Memo {
         std::int64_t id;
@@ -89,6 +100,12 @@ private:
         double end;
 
         auto operator<=>(const Memo&) const = default;
+    };
+    /// A memo in the real programme that shares its id with no other one, and the copies with an edit that it hasn't followed.
+    struct Behind {
+        Memo before; ///< with the name and the place that it had when the copies got theirs
+        Memo memo;
+        std::set<Memo> copies;
     };
     /// The copies in a stretch as they were.
     struct Remembered {
@@ -109,26 +126,40 @@ private:
         std::vector<PlacedMemo> adrift; ///< in no stretch
     };
     class Following;
+    /// What the last note was of.
+    struct Noted {
+        Velmark::Counted<Velmark::ITrackNode> track;
+        Events events;
+        core::Framerate framerate;
+        std::array<double, 3> times;
+    };
 
+    static std::array<double, 3> timesOf(const Previewed& previewed);
     /// Null where nothing is known of the event.
     const Remembered* rememberedOf(const Shown& shown) const;
     static std::vector<Shown> stretchesOf(const Previewed& previewed);
     static Preview previewOf(const PlacedMemos& memos, const Previewed& previewed);
     static Memo memoOf(const HostEvent& event);
     static Memo firstOf(std::int64_t id, std::wstring name = {});
+    void note(const PlacedMemos& placed, const Track& memos, const Previewed& previewed,
+              const std::map<std::int64_t, Behind>& lastBehind);
     /// Of the memos before a time, in seconds of the project's clock, those of the ids that no other one has.
     static std::map<std::int64_t, Memo> onlyOnes(const PlacedMemos& memos, double end,
-                                                 const std::set<std::int64_t>& ids);
+                                                 const std::map<std::int64_t, std::set<Memo>>& ids);
+    /// The same of what was behind at the last note, and is now. What memo and copy have got at one go counts as the memo's.
+    static Behind laterThan(const Behind& last, Behind now);
     /// Of the copies those that their memos haven't followed and that aren't as they were written.
     static std::set<const Velmark::IProjectNode*> editedSince(const Track& memos, const std::vector<Shown>& shown);
 
     Velmark::IHostContext* m_hostContext;
     /// By event and piece.
     std::map<std::shared_ptr<core::EventBase>, std::map<std::size_t, Remembered>> m_remembered;
-    std::set<std::int64_t> m_knownIds; ///< of those copies
-    /// What the memos in the real programme were like whose copies have an edit that they haven't followed, by their ids;
-    /// those alone that share their id with no other one.
-    std::map<std::int64_t, Memo> m_behind;
+    std::set<std::int64_t> m_knownIds;       ///< of those copies
+    std::set<Memo> m_notFollowed;            ///< the other copies
+    std::map<std::int64_t, Behind> m_behind; ///< by their ids
+    /// In all of the preview: what a memo had been like, by what it and its copies were like.
+    std::map<std::pair<Memo, std::set<Memo>>, Memo> m_wereBehind;
+    std::optional<Noted> m_noted;
 };
 
 } // namespace cadrel::host

@@ -39,6 +39,8 @@ MemosById::MemosById(std::vector<PlacedMemo> memos, const core::SecondsRange& ra
 
 std::optional<PlacedMemo> MemosById::take(std::int64_t id, double start)
 {
+    if (id < 0)
+        return std::nullopt;
     const auto isOfId = [&](auto place) { return place != m_indexes.end() && std::get<0>(*place) == id; };
     auto nearest = m_indexes.lower_bound({id, start, 0});
     const auto before = nearest != m_indexes.begin() ? std::prev(nearest) : m_indexes.end();

@@ -56,7 +56,8 @@ public:
     MemosById(std::vector<PlacedMemo> memos, const core::SecondsRange& range);
 
     std::size_t size() const { return m_indexes.size(); }
-    /// The one of that id of which the part in the range starts nearest to a time; nothing when there is none.
+    /// The one of that id of which the part in the range starts nearest to a time; nothing when there is none, and for what has
+    /// no id yet.
     std::optional<PlacedMemo> take(std::int64_t id, double start);
     /// Those that are left.
     std::vector<PlacedMemo> rest() const;

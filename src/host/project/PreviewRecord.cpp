@@ -12,6 +12,7 @@
 #include "host/track/Instant.h"
 #include "host/track/Track.h"
 #include "velmark/Attributes.h"
+#include "velmark/Automation.h"
 #include "velmark/Project.h"
 
 #include <algorithm>
@@ -111,12 +112,18 @@ PreviewRecord PreviewRecord::ofContent(const Track& track, double start, const c
         if (!isBefore(child->getStart(nullptr), start))
             record.add(record.numbersOf(*child));
     }
+    record.m_curves.emplace();
     for (const Node& curve : curvesOf(*track.node())) {
+        std::optional<double> last;
         for (const Node& point : childrenOf(*curve)) {
             const double time = point->getStart(curve.get());
             if (!isBefore(time, start))
-                record.reachTo(time);
+                last = std::max(last.value_or(time), time);
         }
+        if (!last)
+            continue;
+        record.reachTo(*last);
+        record.m_curves->push_back(required(query<IEnvelopeTrack>(curve))->curveNumber());
     }
     return record;
 }
@@ -135,6 +142,13 @@ std::optional<PreviewRecord> PreviewRecord::keptBy(const Track& track)
             return std::nullopt;
         record = PreviewRecord(stored->head, Compared::Contents);
         record->add(events, 0);
+        Numbers curves = readNumbers(*nodeOf(track), AttributeKey::PreviewCurves).value_or(Numbers());
+        if (!curves.empty()) {
+            const double checksum = curves.front();
+            curves.erase(curves.begin());
+            if (checksum == record->checksumOfCurves(curves))
+                record->m_curves = std::move(curves);
+        }
     }
     return record && record->isSound() ? record : std::nullopt;
 }
@@ -186,6 +200,7 @@ void PreviewRecord::dropFrom(const Track& track)
 {
     removeNumbers(*nodeOf(track), AttributeKey::Preview);
     removeNumbers(*nodeOf(track), AttributeKey::PreviewEvents);
+    removeNumbers(*nodeOf(track), AttributeKey::PreviewCurves);
 }
 
 void PreviewRecord::keepOn(IHostContext* context, const Track& track) const
@@ -195,6 +210,13 @@ void PreviewRecord::keepOn(IHostContext* context, const Track& track) const
         removeNumbers(*node, AttributeKey::PreviewEvents);
     else
         writeNumbers(context, *node, AttributeKey::PreviewEvents, m_numbers);
+    if (m_curves) {
+        Numbers curves{checksumOfCurves(*m_curves)};
+        curves.insert(curves.end(), m_curves->begin(), m_curves->end());
+        writeNumbers(context, *node, AttributeKey::PreviewCurves, curves);
+    } else {
+        removeNumbers(*node, AttributeKey::PreviewCurves);
+    }
     const core::Framerate framerate = m_head.framerate.value_or(core::Framerate());
     Numbers head{start(),
                  ContentsLayout,
@@ -246,6 +268,18 @@ void PreviewRecord::add(const Numbers& events, std::size_t from)
 void PreviewRecord::reachTo(double time)
 {
     m_head.end = std::max(end().value_or(time), time);
+}
+
+bool PreviewRecord::hasWrittenOn(std::int32_t curve) const
+{
+    return !m_curves || std::ranges::find(*m_curves, static_cast<double>(curve)) != m_curves->end();
+}
+
+double PreviewRecord::checksumOfCurves(const Numbers& curves) const
+{
+    Numbers all{start()};
+    all.insert(all.end(), curves.begin(), curves.end());
+    return checksumOf(all);
 }
 
 bool PreviewRecord::isSound() const

@@ -22,7 +22,7 @@ namespace cadrel::host {
 class Track;
 
 /// What the system has written on one track in the preview stretch: for a preview, or in a run that has failed since. The
-/// track keeps it in two attributes, which follow the host's undo list and are stored with the project. Only what is written
+/// track keeps it in three attributes, which follow the host's undo list and are stored with the project. Only what is written
 /// down here is ever taken away again; all else in the stretch is the user's.
 ///
 /// Times are seconds from the time origin, and stay true when that moves. The numbers of the first attribute are:
@@ -34,7 +34,11 @@ class Track;
 ///
 ///     start, end, source offset, content        of each event, the content as contentPrintOf gives it
 ///
-/// In earlier projects one attribute has it all: after the start the number 1, rate, flags and end, followed by the events
+/// The third one has the curves with automation:
+///
+///     checksum of the start and of what follows, number of each curve
+///
+/// In earlier projects there is no third one, or one attribute has it all: after the start the number 1, rate, flags and end, followed by the events
 /// with their names alone, as namePrintOf gives them; or only the start, or the start and the end, followed by the start and
 /// end of each event.
 class PreviewRecord {
@@ -64,6 +68,8 @@ public:
     double start() const { return m_head.start; }
     std::optional<double> end() const { return m_head.end; }
     std::optional<core::Framerate> framerate() const { return m_head.framerate; }
+    /// Whether automation was written on a curve. Where that isn't known, each may have some.
+    bool hasWrittenOn(std::int32_t curve) const;
     /// Those of the events that aren't written down here: they begin or end elsewhere, play from elsewhere in their clips, or
     /// have another name, clip or content. Nothing else of an event is compared, and of a record of earlier projects only the
     /// place, or that and the name.
@@ -86,12 +92,15 @@ private:
     void add(const Event& event);
     void add(const Numbers& events, std::size_t from);
     void reachTo(double time);
+    /// Of the third attribute.
+    double checksumOfCurves(const Numbers& curves) const;
     bool isSound() const;
 
     Head m_head;
     Compared m_compared;
     std::map<Known, std::int64_t> m_events; ///< and how many of them are there
     Numbers m_numbers;                      ///< of each event, as they are stored
+    std::optional<Numbers> m_curves;        ///< nothing where they aren't known
 };
 
 /// The events and parts of a track that lie in a stretch or reach into it, in seconds from the time origin.

@@ -42,11 +42,6 @@ void gatherTracks(IProjectNode& parent, std::vector<Counted<ITrackNode>>& tracks
     }
 }
 
-bool areSame(const core::Framerate& a, const core::Framerate& b)
-{
-    return a.rate == b.rate && a.dropFrame == b.dropFrame && a.pulledDown == b.pulledDown;
-}
-
 } // namespace
 
 Project::Project(IHostContext* context, IProjectDocument* document)
@@ -254,7 +249,10 @@ void Project::onProjectChanged()
     m_indexes.clear();
     failure.ofStep([this] { m_mediaPool.notifyListeners(); });
     tellListeners(failure);
-    failure.ofStep([this] { rememberMemos(); });
+    failure.ofStep([this] {
+        if (!hasNotedMemos())
+            rememberMemos();
+    });
     failure.raise();
 }
 
@@ -270,26 +268,40 @@ void Project::onProjectEdited(IEditTransaction& transaction)
 
 void Project::syncMemos(IEditTransaction& transaction)
 {
-    Track& memos = markerTrack(TrackRole::Memos);
-    findMarkerTracks();
-    if (!memos.hasChanged())
+    if (!memoTrack().hasChanged())
         return;
+    Track& memos = markerTrack(TrackRole::Memos);
     const MemoSync::Previewed shown = previewed();
-    memos.assignIds(0.0, shown.offset + shown.moved - timeOrigin());
     m_memoSync.follow(memos, shown, transaction);
+    // Only now, as they may get the id of one whose copy the user has just removed.
+    memos.assignIds(0.0, shown.offset + shown.moved - timeOrigin());
 }
 
 void Project::rememberMemos()
 {
-    // What is known of an earlier preview would be taken for edits of this one.
-    m_memoSync.forget();
-    if (!isPreviewing())
+    if (!isPreviewing()) {
+        m_memoSync.forget();
         return;
+    }
+    // What is known of an earlier preview would be taken for edits of this one.
     m_memoSync.forgetCopies(m_previewEvents->events());
+    m_memoSync.remember(memoTrack(), previewed());
+}
+
+bool Project::hasNotedMemos()
+{
+    if (!isPreviewing())
+        return false;
+    const Track& memos = memoTrack();
+    return !memos.hasChanged() && m_memoSync.hasNoted(memos, previewed());
+}
+
+const Track& Project::memoTrack()
+{
     // An undo may have brought the track back.
     Track& memos = markerTrack(TrackRole::Memos);
-    if (findTrack(memos, TypeWord::Marker, TrackRole::Memos))
-        m_memoSync.remember(memos, previewed());
+    findTrack(memos, TypeWord::Marker, TrackRole::Memos);
+    return memos;
 }
 
 bool Project::isPreviewing() const

@@ -167,7 +167,7 @@ public:
     std::shared_ptr<core::Cut> makeCut(const std::shared_ptr<core::EventBase>& changeEvent);
     /// Brings the preview stretch back over the real programme, from which the markers of an earlier run go. Those that
     /// reach out of a restricted range are cut at its edge: outside of it the programme is still the one that they describe.
-    /// A restricted run clears the preview too, also where its range is empty and nothing is brought back.
+    /// What isn't brought back is cleared, and so are the points of the system's own that a curve runs the same without.
     void completeApply(Velmark::IEditTransaction& transaction);
     /// Writes each on the track of its kind, and none whose track isn't there or is locked by the user. Throws
     /// Result::InvalidArgument for an entry whose kind is none of MarkerKind; earlier ones stay written.
@@ -193,12 +193,12 @@ public:
     void rememberWritten();
     /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
     /// since stays, and so does what he has moved, renamed, slipped or given another length, clip or content; a copy that he
-    /// has changed in no other way than by its gain or the like goes. Automation in the stretch goes from the start of what
-    /// was written on its track.
+    /// has changed in no other way than by its gain or the like goes. Automation goes from the start of what was written on
+    /// its track, on the curves on which something was.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
-    /// What a run replaces, in seconds of the project's clock: the range that the user restricts it to, or else the day that
-    /// timecodes can name. What is before that day stays in any case.
+    /// What a run replaces, in seconds of the project's clock: the day that timecodes can name, and of that the range to which
+    /// the user restricts it. What is before that day or after it stays in any case.
     void getApplyRange(double& start, double& end) const;
     /// Lets the host join the pieces that the cuts have left of one clip.
     void closeRange(bool onlySelected, double start, double end);
@@ -254,6 +254,10 @@ private:
     /// Of the last automation point.
     double latestPoint(const std::vector<Track>& tracks) const;
     void syncMemos(Velmark::IEditTransaction& transaction);
+    /// Whether what rememberMemos has noted last still holds. Only while the host tells of changes.
+    bool hasNotedMemos();
+    /// The track of the memos; dead or empty where there is none.
+    const Track& memoTrack();
 
     // Tracks of the system.
     Track& markerTrack(std::int32_t role) { return m_markerTracks.at(static_cast<std::size_t>(role) - 1); }
@@ -262,9 +266,8 @@ private:
     bool isMarkerTrackOfRuns(const Track& track) const;
     /// All that a run may change but these.
     std::vector<Track> tracksOfTheUser();
-    /// What of a track's events in a stretch the system hasn't written, in seconds from the time origin.
-    static std::vector<Velmark::Counted<Velmark::IProjectNode>> usersEvents(const Track& track,
-                                                                            const core::SecondsRange& stretch);
+    /// Takes away what the tracks have written down.
+    void clearWritten(Velmark::IEditTransaction& transaction, const std::vector<Track>& tracks);
     /// Removes the copies that their memos have followed, wherever they stand: what the user has made of them is in their
     /// memos, which stand before `start`, in seconds from the time origin. All others that he has edited are his own.
     void removeFollowed(Velmark::IEditTransaction& transaction, double start);

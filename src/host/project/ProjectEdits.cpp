@@ -155,8 +155,9 @@ std::vector<SecondsRange> Project::material()
         // Each run marks anew.
         if (isMarkerTrackOfRuns(track))
             continue;
-        for (const HostEvent& event : track.clipEvents()) {
-            const SecondsRange span = track.eventSpan(event);
+        // A run takes away all that stands on a track, of whatever kind.
+        for (const auto& event : childrenOf(*required(query<IProjectNode>(track.node())))) {
+            const SecondsRange span = track.eventSpan(HostEvent(track, event));
             stretches.push_back({origin + span.start, origin + span.end});
         }
         for (const auto& curve : curvesOf(*track.node())) {
@@ -347,9 +348,12 @@ void Project::completeApply(IEditTransaction& transaction)
     start = std::max(start, 0.0);
     if (isBefore(start, end))
         moveBack(transaction, tracks, start, end);
-    if (m_model.settings().restrictRange()) {
-        rememberWritten();
-        clearPreview(transaction);
+    // What stands past the day, or outside of the range, isn't brought back.
+    rememberWritten();
+    clearPreview(transaction);
+    for (const Track& track : tracks) {
+        for (AutomationCurve& curve : track.prepareVirginRange())
+            curve.dropNeedless(transaction, start, end);
     }
 }
 
@@ -379,11 +383,15 @@ double Project::earliestPlace() const
 
 void Project::getApplyRange(double& start, double& end) const
 {
-    const double offset = requiredOffset();
+    // The preview lies days later when something stands past the programme, which no timecode names. What lies past the day
+    // isn't replaced either: there the preview itself may stand.
+    const double latest = std::min(requiredOffset(), dayLength());
     const core::Settings& settings = m_model.settings();
-    start = settings.restrictRange() ? settings.preserveMaterialBefore() : 0.0;
-    // The preview lies days later when something stands past the programme, which no timecode names.
-    end = settings.restrictRange() ? settings.preserveMaterialAfter() : std::min(offset, dayLength());
+    start = settings.restrictRange() ? std::max(settings.preserveMaterialBefore(), 0.0) : 0.0;
+    end = settings.restrictRange() ? std::min(settings.preserveMaterialAfter(), latest) : latest;
+    // Nothing lies between bounds that are stored the wrong way round, or are no numbers.
+    if (!(start <= end))
+        start = end = latest;
 }
 
 void Project::closeRange(bool onlySelected, double start, double end)

@@ -6,13 +6,17 @@
 #include "host/border/FirstFailure.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
+#include "host/project/EventPrint.h"
 #include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
 #include "host/track/Instant.h"
+#include "velmark/Automation.h"
 #include "velmark/Editing.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
+#include <map>
 #include <set>
 #include <utility>
 
@@ -51,23 +55,6 @@ private:
     std::vector<std::pair<Counted<FUnknown>, Node>> m_taken;
 };
 
-/// The smallest stretch that holds all that the tracks have written down; nothing when there is nothing.
-std::optional<core::SecondsRange> writtenStretch(const std::vector<Track>& tracks)
-{
-    std::optional<core::SecondsRange> stretch;
-    for (const Track& track : tracks) {
-        const std::optional<PreviewRecord> record = PreviewRecord::keptBy(track);
-        if (!record || !record->end())
-            continue;
-        // A range doesn't hold its end, where a point may stand.
-        const core::SecondsRange own{record->start(), *record->end() + 2.0 * core::SameInstant};
-        if (!stretch)
-            stretch = own;
-        *stretch = {std::min(stretch->start, own.start), std::max(stretch->end, own.end)};
-    }
-    return stretch;
-}
-
 std::vector<Node> pointsIn(IProjectNode& curve, const core::SecondsRange& stretch)
 {
     std::vector<Node> points = childrenOf(curve);
@@ -76,6 +63,41 @@ std::vector<Node> pointsIn(IProjectNode& curve, const core::SecondsRange& stretc
         return isBefore(time, stretch.start) || !isBefore(time, stretch.end);
     });
     return points;
+}
+
+/// With the events, those that begin together with one of them before a time, all in the order of their track. What is put
+/// back comes to lie on top of all that begins with it.
+std::vector<Node> withThoseBeside(const Track& track, const std::vector<Node>& events, double time)
+{
+    std::set<double> starts;
+    std::set<const IProjectNode*> wanted;
+    for (const Node& event : events) {
+        wanted.insert(event.get());
+        if (event->getStart(nullptr) < time)
+            starts.insert(event->getStart(nullptr));
+    }
+    if (starts.empty())
+        return events;
+    std::vector<Node> all = childrenOf(*required(query<IProjectNode>(track.node())));
+    std::erase_if(all, [&](const Node& event) {
+        return !wanted.contains(event.get()) && !starts.contains(event->getStart(nullptr));
+    });
+    return all;
+}
+
+/// Takes off what the system hasn't written in a stretch. The record is null for a track that has written nothing there. All
+/// automation on a curve on which something is written counts as the system's.
+void takeUsersOff(SparedContent& spared, const Track& track, const PreviewRecord* record,
+                  const core::SecondsRange& stretch)
+{
+    std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
+    if (record)
+        events = MemoSync::othersThan(*record, std::move(events));
+    spared.takeOff(track.container(), withThoseBeside(track, events, stretch.start));
+    for (const Node& curve : curvesOf(*track.node())) {
+        if (!record || !record->hasWrittenOn(required(query<IEnvelopeTrack>(curve))->curveNumber()))
+            spared.takeOff(curve, pointsIn(*curve, stretch));
+    }
 }
 
 } // namespace
@@ -130,32 +152,49 @@ void Project::clearPreview(IEditTransaction& transaction)
     const std::vector<Track> tracks = cadrelTracks();
     if (const auto head = writtenHead())
         removeFollowed(transaction, head->start);
-    if (const auto stretch = writtenStretch(tracks)) {
-        SparedContent spared(transaction);
-        FirstFailure failure;
-        failure.ofStep([&] {
-            for (const Track& track : tracks) {
-                spared.takeOff(track.container(), usersEvents(track, *stretch));
-                const std::optional<PreviewRecord> record = PreviewRecord::keptBy(track);
-                core::SecondsRange users = *stretch;
-                if (record && record->end()) {
-                    users.end = record->start();
-                    removePoints(transaction, track, {users.end, stretch->end});
-                }
-                for (const Node& curve : curvesOf(*track.node()))
-                    spared.takeOff(curve, pointsIn(*curve, users));
-            }
-            deleteRange(transaction, stretch->start + timeOrigin(), stretch->end + timeOrigin());
-        });
-        failure.ofStep([&] { spared.putBack(); });
-        failure.raise();
-    }
+    clearWritten(transaction, tracks);
     for (const Track& track : tracks)
         PreviewRecord::dropFrom(track);
     // What is no longer in the preview stretch isn't followed any more either.
     m_previewEvents->clear();
     m_lockedTracks.clear();
     m_indexes.clear();
+}
+
+// All tracks have written from one time on, but those that come from another project. Each such time is a stretch of its own:
+// a curve that is emptied from earlier on than its track has written would bend there.
+void Project::clearWritten(IEditTransaction& transaction, const std::vector<Track>& tracks)
+{
+    std::vector<std::optional<PreviewRecord>> records;
+    std::map<std::int64_t, core::SecondsRange> stretches;
+    for (const Track& track : tracks) {
+        records.push_back(PreviewRecord::keptBy(track));
+        std::optional<PreviewRecord>& record = records.back();
+        if (record && !record->end())
+            record.reset();
+        if (!record)
+            continue;
+        // A range doesn't hold its end, where a point may stand.
+        const core::SecondsRange own{record->start(), *record->end() + 2.0 * core::SameInstant};
+        core::SecondsRange& stretch = stretches.try_emplace(toInstant(own.start), own).first->second;
+        stretch.end = std::max(stretch.end, own.end);
+    }
+    for (const auto& [start, stretch] : stretches) {
+        SparedContent spared(transaction);
+        FirstFailure failure;
+        failure.ofStep([&, &emptied = stretch] {
+            for (std::size_t index = 0; index < tracks.size(); ++index) {
+                const auto& record = records[index];
+                const bool hasWrittenThere = record && toInstant(record->start()) == toInstant(emptied.start);
+                takeUsersOff(spared, tracks[index], hasWrittenThere ? &*record : nullptr, emptied);
+                if (hasWrittenThere)
+                    removePoints(transaction, tracks[index], emptied);
+            }
+            deleteRange(transaction, emptied.start + timeOrigin(), emptied.end + timeOrigin());
+        });
+        failure.ofStep([&] { spared.putBack(); });
+        failure.raise();
+    }
 }
 
 void Project::removePoints(IEditTransaction& transaction, const Track& track, const core::SecondsRange& stretch)
@@ -167,14 +206,6 @@ void Project::removePoints(IEditTransaction& transaction, const Track& track, co
         for (const Node& point : pointsIn(*curve, stretch))
             requireOk(transaction.remove(curve.get(), point.get()));
     }
-}
-
-std::vector<Node> Project::usersEvents(const Track& track, const core::SecondsRange& stretch)
-{
-    std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
-    if (const auto record = PreviewRecord::keptBy(track))
-        events = MemoSync::othersThan(*record, std::move(events));
-    return events;
 }
 
 void Project::removeFollowed(IEditTransaction& transaction, double start)
@@ -224,8 +255,7 @@ MemoSync::Previewed Project::previewed()
 // A track that comes from another project may keep what was written there, and above all of this one's.
 std::optional<PreviewRecord::Head> Project::writtenHead()
 {
-    findMarkerTracks();
-    if (const Track& memos = markerTrack(TrackRole::Memos); memos.isAlive()) {
+    if (const Track& memos = memoTrack(); memos.isAlive()) {
         if (const auto head = PreviewRecord::headKeptBy(memos))
             return head;
     }

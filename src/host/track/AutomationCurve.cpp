@@ -2,20 +2,43 @@
 
 #include "host/track/AutomationCurve.h"
 
+#include "core/time/SecondsRange.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
 #include "host/track/Instant.h"
+#include "velmark/Attributes.h"
 #include "velmark/Automation.h"
 #include "velmark/ClassId.h"
 #include "velmark/Context.h"
 #include "velmark/Editing.h"
 
+#include <bit>
 #include <cmath>
 #include <utility>
 
 using namespace Velmark;
 
 namespace cadrel::host {
+
+namespace {
+
+/// Values of a curve that are closer than this are the same.
+constexpr double SameValue = 1e-7;
+
+int64 bitsOf(float value)
+{
+    return std::bit_cast<std::uint32_t>(value);
+}
+
+/// Whether the system has written a point that still has its value.
+bool isOwn(IProjectNode& point, double value)
+{
+    FVariant held;
+    return point.getAttribute(AttributeKey::HeldValue, held) == ResultOk && held.isInteger() &&
+           held.asInteger() == bitsOf(static_cast<float>(value));
+}
+
+} // namespace
 
 AutomationCurve::AutomationCurve(FUnknown* curve, double origin)
     : m_curve(required(query<IProjectNode>(curve))), m_origin(origin),
@@ -46,8 +69,11 @@ void AutomationCurve::fill(IHostContext* context, IEditTransaction& transaction,
 {
     if (end < start || isEmpty())
         return;
+    // Whoever wants it filled wants these points: none of them goes again by itself.
     replace(context, transaction, firstAt(start), firstAfter(end),
             {{start, valueBefore(start)}, {end, valueBehind(end)}});
+    for (const Point* const point : {&m_left[m_left.size() - 2], &m_left.back()})
+        requireOk(point->node->removeAttribute(AttributeKey::HeldValue));
 }
 
 void AutomationCurve::hold(IHostContext* context, IEditTransaction& transaction, double start, double end)
@@ -75,8 +101,42 @@ void AutomationCurve::holdLast(IHostContext* context, IEditTransaction& transact
         return;
     }
     const double value = valueBefore(start);
-    if (!haveValue(firstAt(start), size(), value))
-        replace(context, transaction, firstAt(start), size(), {{start, value}});
+    const std::size_t first = firstAt(start);
+    if (haveValue(first, size(), value))
+        return;
+    if (first < firstAfter(start))
+        replace(context, transaction, first + 1, size(), {});
+    else
+        replace(context, transaction, first, size(), {{start, value}});
+}
+
+void AutomationCurve::dropNeedless(IEditTransaction& transaction, double start, double end)
+{
+    partAt(firstAt(start));
+    while (!m_right.empty() && !isBefore(end, m_right.back().time)) {
+        if (isNextNeedless() && isOwn(*m_right.back().node, m_right.back().value)) {
+            requireOk(transaction.remove(m_curve.get(), m_right.back().node.get()));
+            m_right.pop_back();
+        } else {
+            partAt(m_left.size() + 1);
+        }
+    }
+}
+
+bool AutomationCurve::isNextNeedless() const
+{
+    const Point& point = m_right.back();
+    const Point* const before = m_left.empty() ? nullptr : &m_left.back();
+    const Point* const behind = m_right.size() < 2 ? nullptr : &m_right[m_right.size() - 2];
+    const auto hasValue = [&](double value) { return std::abs(point.value - value) <= SameValue; };
+    if (!before || !behind) {
+        const Point* const only = before ? before : behind;
+        return only && hasValue(only->value);
+    }
+    // Of more than two at one time the curve comes to the first and goes on from the last.
+    const double length = behind->time - before->time;
+    return length < core::SameInstant ||
+           hasValue(std::lerp(before->value, behind->value, (point.time - before->time) / length));
 }
 
 bool AutomationCurve::isLevel(double start, double end, double value) const
@@ -106,7 +166,40 @@ void AutomationCurve::level(IHostContext* context, IEditTransaction& transaction
         places.insert(places.begin(), before);
     if (behind.value != value)
         places.push_back(behind);
-    replace(context, transaction, firstAt(start), firstAfter(end), places);
+    leadThrough(context, transaction, std::move(places));
+}
+
+void AutomationCurve::leadThrough(IHostContext* context, IEditTransaction& transaction, std::vector<Place> places)
+{
+    const double start = places.front().time;
+    const double end = places.back().time;
+    std::size_t first = firstAt(start);
+    std::size_t last = firstAfter(end);
+    // What comes to stand at the same time stands exactly there, so that only its order counts.
+    const auto moveTo = [&places](double from, double to) {
+        for (Place& place : places) {
+            if (place.time == from)
+                place.time = to;
+        }
+    };
+    if (first < last && !isBefore(start, at(first).time)) {
+        moveTo(start, at(first).time);
+        places.erase(places.begin());
+        ++first;
+    }
+    const bool keepsLast = first < last && !isBefore(at(last - 1).time, end);
+    if (keepsLast) {
+        --last;
+        moveTo(end, at(last).time);
+        places.pop_back();
+    }
+    replace(context, transaction, first, last, places);
+    // The host puts a point after those that stand there already.
+    if (keepsLast && !places.empty() && !isBefore(places.back().time, end)) {
+        IProjectNode* const kept = m_right.back().node.get();
+        requireOk(transaction.remove(m_curve.get(), kept));
+        requireOk(transaction.insert(m_curve.get(), kept));
+    }
 }
 
 void AutomationCurve::replace(IHostContext* context, IEditTransaction& transaction, std::size_t first, std::size_t last,
@@ -190,6 +283,7 @@ AutomationCurve::Point AutomationCurve::insertPoint(IHostContext* context, IEdit
     const auto held = static_cast<float>(value);
     requireOk(point->setValue(held));
     requireOk(node->setStart(m_curve.get(), 0, time - m_origin));
+    requireOk(node->setAttribute(AttributeKey::HeldValue, FVariant::integer(bitsOf(held)), true));
     requireOk(transaction.insert(m_curve.get(), node.get()));
     return {time, held, node};
 }

@@ -58,6 +58,9 @@ public:
     /// As hold, but for good where no point stands after `end`.
     void holdLast(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end);
 
+    /// Takes away what was held by an object of this class from `start` to `end`, where the curve runs the same without it.
+    void dropNeedless(Velmark::IEditTransaction& transaction, double start, double end);
+
 private:
     struct Point {
         double time;
@@ -96,6 +99,11 @@ private:
     bool isLevel(double start, double end, double value) const;
     void level(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double start, double end,
                double value);
+    /// Lets the curve go from the first place to the last through those between. The first is at `start`, with what the curve
+    /// has come to there, and the last at `end`, with what it goes on with. Points that stand there stay.
+    void leadThrough(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, std::vector<Place> places);
+    /// Whether the curve runs the same without the next point to the right.
+    bool isNextNeedless() const;
     /// Puts new points in the place of those from `first` up to `last`, by index.
     void replace(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, std::size_t first,
                  std::size_t last, const std::vector<Place>& places);

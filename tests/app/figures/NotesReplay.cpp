@@ -53,6 +53,7 @@ NotesReplay::NotesReplay(const json& notes, const EdlFrames& oldCut, const EdlFr
             for (int frame = 0; frame < count; ++frame)
                 table.push_back({oldCut.startOf(place) + frame, false});
         }
+        m_bases.push_back(timeOf((reel.at("old").is_null() ? reel.at("new") : reel.at("old")).at("start")));
         m_before.push_back(static_cast<int>(table.size()));
         m_tables.push_back(std::move(table));
     }
@@ -71,18 +72,11 @@ void NotesReplay::check(bool isRight, const std::string& what, const json& where
         m_faults.push_back(what + ": " + where.dump());
 }
 
-/// The timecode that places in a reel are counted from.
-int NotesReplay::baseOf(std::size_t reel) const
-{
-    const json& pair = m_notes.at("reels")[reel];
-    return timeOf((pair.at("new").is_null() ? pair.at("old") : pair.at("new")).at("start"));
-}
-
 /// The reel of a place whose figures agree.
 std::size_t NotesReplay::placeIn(const json& place)
 {
     const auto reel = static_cast<std::size_t>(intOf(place, "reel") - 1);
-    check(timeOf(place.at("timecode")) == baseOf(reel) + intOf(place, "frame"), "timecode of a place", place);
+    check(timeOf(place.at("timecode")) == m_bases.at(reel) + intOf(place, "frame"), "timecode of a place", place);
     if (place.contains("feet")) {
         const int frame = intOf(place, "frame");
         const std::string rest = std::to_string(frame % 16);
@@ -136,6 +130,8 @@ void NotesReplay::carryOut(const json& step, std::size_t reel)
     const int before = static_cast<int>(m_tables[reel].size());
     m_removed.clear();
     m_inserted.clear();
+    if (step.at("action") == "move-reel")
+        moveReel(step, reel);
     placeIn(step.at("at"));
     if (step.at("action") == "move")
         move(step);
@@ -144,6 +140,15 @@ void NotesReplay::carryOut(const json& step, std::size_t reel)
     check(intOf(step, "lengthChangeFrames") == static_cast<int>(m_tables[reel].size()) - before, "change of length",
           step);
     lookAtChanges(step);
+}
+
+/// Before it the reel begins where it did, and after it where it does now.
+void NotesReplay::moveReel(const json& step, std::size_t reel)
+{
+    check(placeIn(step.at("from")) == reel && intOf(step.at("from"), "frame") == 0, "where a reel began", step);
+    m_bases.at(reel) += intOf(step.at("changes").at(0), "frames");
+    check(placeIn(step.at("at")) == reel && intOf(step.at("at"), "frame") == 0, "where a reel begins", step);
+    m_extents[m_steps] = 0;
 }
 
 void NotesReplay::replace(const json& step)
@@ -282,7 +287,11 @@ void NotesReplay::lookAtChange(const json& change, const json& step)
         const int was = static_cast<int>(std::lround(change.at("oldShot").at("speed").get<double>() * 100));
         const int now = static_cast<int>(std::lround(change.at("newShot").at("speed").get<double>() * 100));
         check(was != now, "no other speed", step);
-        m_phrases.push_back("speed " + std::to_string(was) + " now " + std::to_string(now) + " %");
+        const auto isFreeze = [&change](const char* shot) {
+            return timeOf(change.at(shot).at("srcOut")) - timeOf(change.at(shot).at("srcIn")) <= 1;
+        };
+        if (!isFreeze("oldShot") && !isFreeze("newShot"))
+            m_phrases.push_back("speed " + std::to_string(was) + " now " + std::to_string(now) + " %");
         lookAtSource(change);
     } else if (kind == "head-trimmed" || kind == "tail-trimmed") {
         lookAtTrim(change);
@@ -359,6 +368,7 @@ void NotesReplay::lookAtResult()
         const int first = m_newCut.startOf(place);
         const auto length = m_newCut.reels()[place].frames.size();
         check(m_tables[reel].size() == length && pair.at("new").at("frames") == length, "new length", pair.at("new"));
+        check(timeOf(pair.at("new").at("start")) == m_bases[reel], "a reel begins elsewhere", pair.at("new"));
         bool isRunning = false;
         for (int frame = 0; frame < static_cast<int>(std::min(length, m_tables[reel].size())); ++frame) {
             const Piece& piece = m_tables[reel][static_cast<std::size_t>(frame)];
@@ -469,6 +479,8 @@ void NotesReplay::showRow(const json& row, std::size_t reel)
         const bool goesOn = at.at("reel") != static_cast<int>(reel) + 1 ||
                             (isFromThisReel && intOf(from, "frame") < intOf(at, "frame"));
         times = {(goesOn ? from : at).at("timecode"), length("moveFrames"), (goesOn ? at : from).at("timecode")};
+    } else if (row.at("action") == "move-reel") {
+        times = {row.at("from").at("timecode"), row.at("at").at("timecode")};
     } else if (row.at("action") == "relabel") {
         times.push_back(length("insertFrames"));
     } else {

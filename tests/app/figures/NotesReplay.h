@@ -47,11 +47,11 @@ private:
     using Table = std::vector<Piece>;
 
     void check(bool isRight, const std::string& what, const nlohmann::json& where);
-    int baseOf(std::size_t reel) const;
     std::size_t placeIn(const nlohmann::json& place);
     void carryOutRow(const nlohmann::json& row, std::size_t reel);
     void lookAtMoveEnd(const nlohmann::json& row, std::size_t reel);
     void carryOut(const nlohmann::json& step, std::size_t reel);
+    void moveReel(const nlohmann::json& step, std::size_t reel);
     void replace(const nlohmann::json& step);
     void move(const nlohmann::json& step);
     void lookAtChanges(const nlohmann::json& step);
@@ -68,6 +68,7 @@ private:
     const EdlFrames& m_oldCut;
     const EdlFrames& m_newCut;
     std::vector<Table> m_tables; ///< of each pair of reels
+    std::vector<int> m_bases;    ///< the timecodes at which they begin by then
     std::vector<int> m_before;   ///< their lengths at first
     std::vector<int> m_removed;  ///< frames of the old cut that the step has deleted
     std::vector<int> m_inserted; ///< frames of the new cut that it has put in

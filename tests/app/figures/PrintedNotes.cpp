@@ -87,10 +87,12 @@ std::string feetOf(const json& step)
             return isNamed ? " of reel " + std::to_string(step.at(end).at("reel").get<int>()) : std::string();
         };
         return "take out " + through(step.at("from").at("frame"), step.at("moveFrames")) + reelOf("from") +
-               ", insert at " + feet(place) + reelOf("at");
+               ", put in from " + feet(place) + reelOf("at");
     }
     const int removed = step.at("deleteFrames");
     const int inserted = step.at("insertFrames");
+    if (step.at("action") == "move-reel")
+        return {};
     if (step.at("action") == "relabel")
         return "new version from " + through(place, inserted);
     std::string text = removed == 0 ? "" : "delete " + through(place, removed);
@@ -104,6 +106,31 @@ std::string wipeOrDissolve(const json& shot)
     return shot.at("transition").get<std::string>() + " of " + std::to_string(shot.at("transitionFrames").get<int>());
 }
 
+/// Nothing where the change doesn't bring or take one with it.
+std::string withTransition(const json& change, const char* side, const char* shot, const std::string& with)
+{
+    if (!change.contains(side))
+        return {};
+    const char* const frames = change.at(shot).at("transitionFrames") == 1 ? " frame" : " frames";
+    return std::string(", ").append(with).append(wipeOrDissolve(change.at(shot))).append(frames);
+}
+
+int framesBetween(const json& shot, const char* in, const char* out)
+{
+    return framesOfTimecode(shot.at(out)) - framesOfTimecode(shot.at(in));
+}
+
+/// One frame of source at a speed of its own.
+bool isFreeze(const json& shot)
+{
+    return framesBetween(shot, "srcIn", "srcOut") <= 1 && shot.at("speed") != 1.0;
+}
+
+std::string speedOf(const json& shot)
+{
+    return isFreeze(shot) ? "freeze" : "speed " + percent(shot) + " %";
+}
+
 std::string labelOf(const std::string& kind)
 {
     static const std::map<std::string, std::string> labels{{"head-trimmed", "head"},
@@ -113,7 +140,8 @@ std::string labelOf(const std::string& kind)
                                                            {"version-changed", "version"},
                                                            {"transition-added", "transition"},
                                                            {"transition-removed", "transition"},
-                                                           {"transition-changed", "transition"}};
+                                                           {"transition-changed", "transition"},
+                                                           {"reel-moved", "reel"}};
     return labels.contains(kind) ? labels.at(kind) : kind;
 }
 
@@ -188,7 +216,7 @@ std::string fatesOf(const json& count)
                                           {number("trimmed"), "trimmed"},
                                           {number("split"), "split"},
                                           {number("doubled"), "doubled"},
-                                          {number("inNoCut"), "in no cut"},
+                                          {number("inNoCut"), "fell out"},
                                           {number("new"), "new"}});
     return text.empty() ? "" : ": " + text;
 }
@@ -334,6 +362,13 @@ std::string PrintedNotes::materialOf(const json& change) const
     return (roll.empty() ? "" : "roll " + roll + ", ") + "source " + change.at("sourceIn").get<std::string>();
 }
 
+std::string PrintedNotes::formerVersion(const json& change) const
+{
+    const char* const key = m_notes.at("match") == "clip" ? "clip" : "roll";
+    const std::string was = change.at("oldShot").at(key);
+    return was == change.at("newShot").at(key) ? "" : ", as " + cutTo(was, ColumnsOfAName);
+}
+
 PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
 {
     const std::string kind = change.at("kind");
@@ -351,38 +386,55 @@ PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
                     counted(static_cast<std::size_t>(std::abs(frames)), "frame"),
                 name,
                 {}};
+    const std::string newTransition = withTransition(change, "newTransition", "newShot", "with a ");
+    const std::string oldTransition = withTransition(change, "oldTransition", "oldShot", "with a ");
+    const auto withoutComma = [](const std::string& text) { return text.starts_with(", ") ? text.substr(2) : text; };
     if (kind == "lifted" && change.contains("part"))
-        return {"lifted part " + time, oldName, "in the old cut" + at()};
+        return {"lifted part " + time, oldName, "in the old cut" + at() + oldTransition};
     if (kind == "lifted")
-        return {"lifted " + time + at(), oldName, {}};
+        return {"lifted " + time + at(), oldName, withoutComma(oldTransition)};
     if (kind == "inserted") {
         const bool isRetimed = !now.is_null() && now.at("speed") != 1.0;
-        return {"inserted " + time, name, materialOf(change) + (isRetimed ? ", speed " + percent(now) + " %" : "")};
+        return {"inserted " + time, name, materialOf(change) + (isRetimed ? ", " + speedOf(now) : "") + newTransition};
     }
     if (kind == "replaced")
-        return {"replaced " + time, name, materialOf(change) + (now.is_null() ? "" : ", ") + "was " + oldName + at()};
+        return {"replaced " + time, name,
+                withoutComma(materialOf(change) + newTransition + ", was " + oldName + at() + oldTransition)};
     if (kind == "moved")
         return {"moved " + time, withMore(name, moreShots), "in the old cut" + at()};
     if (kind == "unchanged")
         return {"unchanged " + time, withMore(name, moreShots), {}};
     if (kind == "doubled")
-        return {"once more " + time, name, "stood once in the old cut" + at()};
-    if (kind == "retimed")
-        return {"speed " + percent(was) + " now " + percent(now) + " %", name,
-                "was " + length(change.at("old"), "frames") + " long, is " + length(change.at("new"), "frames") + ", " +
-                    materialOf(change)};
-    if (kind == "version-changed") {
-        const char* const key = m_notes.at("match") == "clip" ? "clip" : "roll";
-        return {"was " + cutTo(was.at(key), 28), cutTo(now.at(key), ColumnsOfAName), {}};
+        return {"once more " + time, withMore(name, moreShots),
+                "stood once in the old cut" + at() + formerVersion(change)};
+    const char* const matched = m_notes.at("match") == "clip" ? "clip" : "roll";
+    if (kind == "retimed") {
+        const bool isSameVersion = was.at(matched) == now.at(matched);
+        const std::string speeds = isFreeze(was) || isFreeze(now)
+                                       ? speedOf(was) + " now " + speedOf(now)
+                                       : "speed " + percent(was) + " now " + percent(now) + " %";
+        const std::string former = oldTransition == newTransition
+                                       ? std::string()
+                                       : withTransition(change, "oldTransition", "oldShot", "had a ");
+        return {speeds, isSameVersion ? name : cutTo(now.at(matched), ColumnsOfAName),
+                "was " + (isSameVersion ? "" : cutTo(was.at(matched), ColumnsOfAName) + ", ") +
+                    length(change.at("old"), "frames") + " long, is " + length(change.at("new"), "frames") + ", " +
+                    materialOf(change) + newTransition + former};
     }
+    if (kind == "reel-moved")
+        return {time + (frames < 0 ? " earlier" : " later"), "the whole reel", {}};
+    if (kind == "version-changed")
+        return {"was " + cutTo(was.at(matched), 28), cutTo(now.at(matched), ColumnsOfAName), {}};
     if (kind == "transition-added")
         return {wipeOrDissolve(now) + " frames added", name, {}};
     if (kind == "transition-removed")
-        return {wipeOrDissolve(was) + " frames removed", name, {}};
-    return {now.at("transition").get<std::string>() + " of " + std::to_string(was.at("transitionFrames").get<int>()) +
-                " now " + std::to_string(now.at("transitionFrames").get<int>()) + " frames",
-            name,
-            {}};
+        return {wipeOrDissolve(was) + " frames removed", oldName, {}};
+    if (was.at("transition") != now.at("transition"))
+        return {wipeOrDissolve(was) + " now " + wipeOrDissolve(now), name, {}};
+    if (was.at("transitionFrames") == now.at("transitionFrames"))
+        return {wipeOrDissolve(was) + ", other picture", name, {}};
+    return {
+        wipeOrDissolve(was) + " now " + std::to_string(now.at("transitionFrames").get<int>()) + " frames", name, {}};
 }
 
 std::string PrintedNotes::changeOf(const json& change, Form form) const
@@ -438,7 +490,8 @@ std::string PrintedNotes::placeOf(const json& row, std::size_t reel) const
 {
     if (row.at("row") == "kept")
         return row.at("newIn");
-    const bool isFrom = row.at("row") == "step" && row.at("action") == "move" && goesOn(row, reel);
+    const bool isFrom = row.at("row") == "step" &&
+                        ((row.at("action") == "move" && goesOn(row, reel)) || row.at("action") == "move-reel");
     return row.at(isFrom ? "from" : "at").at("timecode");
 }
 
@@ -456,6 +509,8 @@ std::string PrintedNotes::actionOf(const json& row, std::size_t reel) const
         return "move " + length(row, "moveFrames") +
                (goesOn(row, reel) ? " to " + row.at("at").at("timecode").get<std::string>()
                                   : " from " + row.at("from").at("timecode").get<std::string>());
+    if (row.at("action") == "move-reel")
+        return "move the whole reel to " + row.at("at").at("timecode").get<std::string>();
     if (row.at("action") == "relabel")
         return "new version, " + length(row, "insertFrames");
     const int removed = row.at("deleteFrames");
@@ -497,7 +552,8 @@ std::string PrintedNotes::rowOf(const json& row, std::size_t reel, int offset, F
     for (const json& change : row.at("changes"))
         below = line({below, changeOf(change, form)});
     if (row.at("joinedSteps") > 1)
-        below = line({below, "joined from", std::to_string(row.at("joinedSteps").get<int>()), "trims that cancel out"});
+        below = line(
+            {below, "joined from", std::to_string(row.at("joinedSteps").get<int>()), "steps whose trims cancel out"});
     below = line({below, row.at("at").contains("feet") ? feetOf(row) : "",
                   row.contains("sound") ? soundOf(row.at("sound"), form) : ""});
     const int changed = row.at("lengthChangeFrames");
@@ -509,6 +565,8 @@ std::string PrintedNotes::rowOf(const json& row, std::size_t reel, int offset, F
 std::string PrintedNotes::shotsOf(const json& step) const
 {
     const json& largest = largestOf(step);
+    if (largest.at("kind") == "reel-moved")
+        return wordsOf(largest).what;
     std::set<json> told = shotsIn(largest);
     std::size_t more = 0;
     for (const json& change : step.at("changes")) {
@@ -516,11 +574,12 @@ std::string PrintedNotes::shotsOf(const json& step) const
         const bool isTold =
             change.at("kind") == "unchanged" || shots.empty() ||
             std::any_of(shots.begin(), shots.end(), [&](const json& shot) { return told.contains(shot); });
-        more += isTold ? 0 : 1;
+        more += isTold ? 0 : change.value("shots", std::size_t(1));
         if (change.at("kind") != "unchanged")
             told.insert(shots.begin(), shots.end());
     }
-    return withMore(wordsOf(largest).shot, more);
+    const std::size_t others = largest.value("shots", std::size_t(1)) - 1;
+    return others == 0 ? withMore(wordsOf(largest).shot, more) : withMore(nameOf(largest.at("newShot")), others + more);
 }
 
 std::string PrintedNotes::largest(Form form) const
@@ -602,11 +661,13 @@ std::string PrintedNotes::remarks() const
         joined += step.row->at("joinedSteps") > 1 ? step.row->at("joinedSteps").get<std::size_t>() : 0;
     std::string text;
     if (events > 0)
-        text = "For the change EDL that cadrel makes of these cuts: " + counted(events, "event") + " healed from " +
-               std::to_string(healed.at("members").get<int>()) +
-               (gaps > 0 ? ", " + counted(gaps, "gap") + " covered" : "") + "; the steps above are not healed";
+        text = (m_notes.contains("sound") ? "Of the change EDL that was applied: "
+                                          : "For the change EDL that cadrel makes of these cuts: ") +
+               counted(events, "event") + " healed from " + std::to_string(healed.at("members").get<int>()) +
+               (gaps > 0 ? ", " + counted(gaps, "gap") + " covered" : "") +
+               (m_steps.empty() ? "" : "; the steps above are not healed");
     if (joined > 0)
-        text = line({text, std::to_string(joined), "trims that cancel out within",
+        text = line({text, std::to_string(joined), "steps whose trims cancel out within",
                      counted(m_notes.at("simplifyFrames").get<std::size_t>(), "frame"), "are joined"});
     return text.empty() ? "" : "Healed, doubted and passed over " + text;
 }
@@ -668,18 +729,19 @@ std::vector<PrintedNotes::SoundLine> PrintedNotes::soundLines(const json& sound)
         else if (kind == "split")
             what = hasLost ? "split, -" + frames : "split";
         else if (kind == "doubled")
-            what = "once more, at " + start("now") + " now";
+            what = "once more";
         else if (kind == "fell-out")
             what = hasLost ? "fell out, " + frames : "fell out";
         const std::string part = change.contains("part") ? " (in " + cutTo(change.at("part"), 40) + ")" : std::string();
         const std::string name = change.at("name");
         lines.push_back(
             {what, start(kind == "added" ? "now" : "was"),
-             cutTo(change.at("trackName"), 24) + ": " + (name.empty() ? "(no name)" : cutTo(name, 40)) + part});
+             cutTo(change.at("trackName"), 24) + ": " + (name.empty() ? "(no name)" : cutTo(name, 40)) + part,
+             kind == "doubled" ? ", now at " + start("now") : ""});
     }
     for (const json& jump : sound.at("automationJumps")) {
         lines.push_back({"automation jumps", exactTimecode(jump.at("in").at("seconds").get<double>() + originOf(jump)),
-                         firstTracks(jump.at("tracks"))});
+                         firstTracks(jump.at("tracks")), ""});
     }
     return lines;
 }
@@ -695,13 +757,13 @@ std::string PrintedNotes::soundOf(const json& sound, Form form) const
     text = line({text, form == Form::Page ? "sound" : "sound:", soundSummary(sound, true)});
     const std::vector<SoundLine> lines = soundLines(sound);
     for (std::size_t index = 0; index < std::min(lines.size(), MostLines); ++index) {
-        const auto& [what, time, name] = lines[index];
+        const auto& [what, time, name, more] = lines[index];
         if (form == Form::Text) {
-            text = line({text, what, time, name});
+            text = line({text, what, time, name + more});
         } else if (form == Form::Page) {
-            text = line({text, time, name, what});
+            text = line({text, time, name, what + more});
         } else {
-            text = line({text, time, name + ": " + what});
+            text = line({text, time, name + ": " + what + more});
         }
     }
     if (lines.size() > MostLines)
@@ -716,7 +778,7 @@ std::string PrintedNotes::soundCells(const json& sound) const
         tracks += (tracks.empty() ? "" : ", ") + trackName(track);
     std::string lines;
     for (const SoundLine& line : soundLines(sound))
-        lines += (lines.empty() ? "" : "; ") + line.name + " at " + line.time + ": " + line.what;
+        lines += (lines.empty() ? "" : "; ") + line.name + " at " + line.time + ": " + line.what + line.more;
     const auto number = [](std::size_t count) { return std::to_string(count); };
     std::string row;
     for (const std::string& cell :
@@ -724,7 +786,7 @@ std::string PrintedNotes::soundCells(const json& sound) const
           number(countOf(sound, {"split"})), number(countOf(sound, {"doubled"})), number(countOf(sound, {"fell-out"})),
           number(countOf(sound, {"added"})), number(sound.at("movedClips")), tracks,
           number(sound.at("automationJumps").size()), lines})
-        row += "," + inQuotes(cell);
+        row.append(",").append(inQuotes(cell));
     return row;
 }
 
@@ -750,6 +812,7 @@ std::string PrintedNotes::body(Form form) const
 std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
 {
     const bool isMove = step.at("action") == "move";
+    const bool hasFrom = isMove || step.at("action") == "move-reel";
     const int moved = isMove ? step.at("moveFrames").get<int>() : 0;
     const int removed = step.at("deleteFrames");
     const int inserted = step.at("insertFrames");
@@ -772,7 +835,7 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
                                          std::to_string(reel + 1),
                                          step.at("action"),
                                          step.at("at").at("timecode"),
-                                         isMove ? step.at("from").at("timecode").get<std::string>() : "",
+                                         hasFrom ? step.at("from").at("timecode").get<std::string>() : "",
                                          time(removed),
                                          time(inserted),
                                          time(moved),
@@ -788,9 +851,9 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
                                          placeIn("new"),
                                          changes,
                                          feet(step.at("at").at("frame")),
-                                         isMove ? feet(step.at("from").at("frame")) : "",
+                                         hasFrom ? feet(step.at("from").at("frame")) : "",
                                          std::to_string(step.at("at").at("reel").get<int>()),
-                                         isMove ? std::to_string(step.at("from").at("reel").get<int>()) : "",
+                                         hasFrom ? std::to_string(step.at("from").at("reel").get<int>()) : "",
                                          m_notes.at("rate"),
                                          largest.value("sourceIn", "")};
     std::string row;

@@ -41,9 +41,11 @@ private:
         std::string what;
         std::string time;
         std::string name;
+        std::string more;
     };
 
     Words wordsOf(const nlohmann::json& change) const;
+    std::string formerVersion(const nlohmann::json& change) const;
     std::string materialOf(const nlohmann::json& change) const;
     std::string actionOf(const nlohmann::json& row, std::size_t reel) const;
     std::string placeOf(const nlohmann::json& row, std::size_t reel) const;

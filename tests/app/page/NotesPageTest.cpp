@@ -596,6 +596,49 @@ TEST_F(NotesPage, FitsANarrowWindow)
     EXPECT_LE(count("document.documentElement.scrollWidth"), 420);
 }
 
+TEST_F(NotesPage, TheChangesHaveRoomInAWindowOfAnyWidth)
+{
+    for (const int width : {420, 600, 601, 768, 900, 901, 1040, 1041, 1240}) {
+        browser.resize(width, 800);
+
+        EXPECT_LE(count("document.documentElement.scrollWidth"), width);
+        EXPECT_LE(count("all('.wide').filter(e => e.scrollWidth > e.clientWidth).length"), 0) << width;
+        EXPECT_GE(count("document.querySelector('#s17 td:nth-child(4)').offsetWidth"), 250) << width;
+    }
+}
+
+TEST_F(NotesPage, NoNumberOfAReelLiesOnAnother)
+{
+    // Reels of 20 s and of 40 s in turn.
+    std::string film;
+    for (int reel = 1; reel <= 9; ++reel) {
+        const std::string number = std::to_string(reel);
+        const std::string hour = std::string("0").append(number).append(":00:");
+        const std::string end = reel % 2 == 0 ? "40:00" : "00:12";
+        film += cut(std::string("00").append(number), std::string("R").append(number),
+                    std::string("10:00:00:00 10:00:").append(end),
+                    std::string(hour).append("00:00 ").append(hour).append(end));
+    }
+    show(pageOf(film, film));
+    const std::string shown = "all('.reels')[0].querySelectorAll('b:not([hidden])').length";
+    const std::string lying =
+        "all('.reels').flatMap(strip => [...strip.querySelectorAll('b:not([hidden])')].filter((b, i, "
+        "all) => i > 0 && all[i - 1].getBoundingClientRect().right > "
+        "b.getBoundingClientRect().left + 0.5)).length";
+
+    EXPECT_EQ(count(shown), 4);
+    EXPECT_EQ(count(lying), 0);
+    browser.resize(420, 800);
+    browser.valueOf("new Promise(done => requestAnimationFrame(() => done(0)))");
+    EXPECT_EQ(count(lying), 0);
+}
+
+TEST_F(NotesPage, NamesStandApartFromTheFiguresBesideThem)
+{
+    EXPECT_EQ(count("all('.change .tag').filter(tag => tag.nextElementSibling?.tagName !== 'BDI').length"), 0);
+    EXPECT_EQ(count("all('ol.largest li').filter(line => !line.querySelector('bdi')).length"), 0);
+}
+
 /// The texts of the page on paper.
 std::string textOnPaper(Browser& browser, const TempFolder& folder)
 {
@@ -617,6 +660,34 @@ TEST_F(NotesPage, PrintsEveryStep)
     }
     EXPECT_EQ(paper.find("zoom in"), std::string::npos);
     EXPECT_EQ(paper.find("Left out"), std::string::npos);
+}
+
+TEST_F(NotesPage, TheColoursAreExplainedOnPaper)
+{
+    const std::string paper = unbroken(textOnPaper(browser, *s_folder));
+
+    EXPECT_NE(paper.find("kept trimmed lifted inserted replaced moved doubled VFX version transitions"),
+              std::string::npos)
+        << paper;
+    EXPECT_EQ(paper.find("next and previous step"), std::string::npos);
+    EXPECT_NE(paper.find("step at what to do"), std::string::npos) << paper;
+}
+
+TEST_F(NotesPage, TheLastOfTheKindsThatAreLeftOutHasAnOr)
+{
+    const std::string leaveOut = "boxes.forEach(box => { box.checked = !kinds.includes(box.value); });"
+                                 "boxes[0].dispatchEvent(new Event('change'));";
+    const std::string note = "document.querySelector('.left').textContent";
+    const auto noteFor = [&](const std::string& kinds) {
+        return browser.valueOf("(kinds => { " + leaveOut + " return " + note + "; })(" + kinds + ")")
+            .get<std::string>();
+    };
+
+    EXPECT_EQ(noteFor("['kept']").find("Left out: lines that are only kept, and that colour"), 0U);
+    EXPECT_EQ(noteFor("['kept', 'lifted']").find("Left out: lines that are only kept or lifted, and those colours"),
+              0U);
+    EXPECT_EQ(noteFor("['kept', 'lifted', 'moved']").find("Left out: lines that are only kept, lifted or moved, and"),
+              0U);
 }
 
 TEST_F(NotesPage, SaysOnPaperWhatIsLeftOut)

@@ -20,6 +20,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <optional>
 #include <set>
 #include <string>
 #include <utility>
@@ -117,7 +118,8 @@ std::vector<SecondsRange> anyMaterial()
     const int count = number(0, 6);
     for (int index = 0; index < count; ++index) {
         const int start = number(0, 400);
-        material.push_back({static_cast<double>(start), static_cast<double>(start + number(0, 30))});
+        const int longest = number(0, 4) == 0 ? 400 : 30;
+        material.push_back({static_cast<double>(start), static_cast<double>(start + number(0, longest))});
     }
     return material;
 }
@@ -198,12 +200,12 @@ bool holdsMaterial(const std::vector<SecondsRange>& material, std::int32_t frame
 }
 
 /// A film of which each shot shows something that no other shows, with short black between.
-Film filmOfStrangers(int shots)
+Film filmOfStrangers(int shots, const std::string& rolls = "R")
 {
     Film film;
     film.at(number(5, 30));
     for (int shot = 0; shot < shots; ++shot) {
-        const std::string roll = std::string("R").append(std::to_string(shot));
+        const std::string roll = rolls + std::to_string(shot);
         const int kind = number(0, 6);
         if (kind == 0)
             film.freeze(roll, 30, number(1, 20));
@@ -486,6 +488,77 @@ RC_GTEST_PROP(KeepLaw, AfterOneChangeAllMovesByOneShiftAndNothingBefore, ())
     RC_ASSERT(plan.events.size() == 1U);
     RC_ASSERT(plan.events.front().shift == shift);
     RC_ASSERT(plan.events.front().destination == rest);
+}
+
+namespace {
+
+/// Two reels, the second at a time of its own, of which one changes at one place.
+struct TwoReels {
+    TwoReels()
+    {
+        const int shots = number(3, 8);
+        const Film first = filmOfStrangers(shots);
+        const Film second = filmOfStrangers(shots, "S");
+        const bool isFirst = number(0, 2) == 0;
+        const Film changed = changeOnce(isFirst ? first : second, shots).changed;
+        const auto put = [this, &second](const Film& reel1, const Film& reel2) {
+            return Film(reel1).at(secondStart).append(reel2, second.framesOf(0).start);
+        };
+        before = put(first, second);
+        after = isFirst ? put(changed, second) : put(first, changed);
+    }
+
+    std::int32_t secondStart = number(900, 1000);
+    Film before;
+    Film after;
+};
+
+/// Where the black at a frame of the old programme goes.
+std::optional<std::int32_t> shiftOfBlack(std::int32_t frame, const CarriedFrames& carried)
+{
+    for (const CarriedStretch& part : carried.parts()) {
+        if (part.from == CarriedFrom::Black && part.source().contains(frame))
+            return part.shift;
+    }
+    return std::nullopt;
+}
+
+} // namespace
+
+RC_GTEST_PROP(KeepLaw, TailsAndPopsGoWithTheirReelsWhateverClipsSpanThem, ())
+{
+    const TestProject project(FrameASecond);
+    const TwoReels films;
+    const FrameModel model(films.before.list(), films.after.list());
+    const std::vector<FrameRange> was = model.oldReels();
+    const std::vector<FrameRange> is = model.newReels();
+    RC_ASSERT(was.size() == 2U);
+    RC_ASSERT(is.size() == 2U);
+    const std::int32_t tail = was[0].end + number(0, 55);
+    const std::int32_t pop = was[1].start - number(1, 55);
+    const std::int32_t secondTail = was[1].end + number(0, 55);
+    std::vector<SecondsRange> material;
+    for (const std::int32_t frame : {tail, pop, secondTail})
+        material.push_back({static_cast<double>(frame), frame + 1.0});
+    bool isFilled = false;
+    const int clips = number(1, 4);
+    for (int clip = 0; clip < clips; ++clip) {
+        const std::int32_t start = number(0, was[0].end + 60);
+        const std::int32_t end = number(was[1].start - 59, 1900);
+        isFilled = isFilled || (start <= was[0].end && end >= was[1].start);
+        material.insert(material.begin() + number(0, 3), {static_cast<double>(start), static_cast<double>(end)});
+    }
+
+    const KeepPlan plan = planFor(films.before, films.after, material);
+
+    const CarriedFrames carried(plan);
+    const std::int32_t growth = is[0].end - was[0].end;
+    RC_ASSERT(shiftOfBlack(tail, carried) == growth);
+    RC_ASSERT(shiftOfBlack(pop, carried) == 0);
+    RC_ASSERT(shiftOfBlack(secondTail, carried) == is[1].end - was[1].end);
+    const std::int32_t lost = lengthOf(core::within({was[0].end, was[1].start}, plan.lost));
+    RC_ASSERT(lost <= std::max(growth, 0));
+    RC_ASSERT(!isFilled || lost == std::max(growth, 0));
 }
 
 TEST(KeepLaw, EveryEdlOfTheTreeOntoItselfNeedsNoRun)

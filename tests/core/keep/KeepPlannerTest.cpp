@@ -449,6 +449,106 @@ TEST_F(KeepPlannerTest, TailAndPopOfTwoReelsFollowEachItsOwn)
                                            "1298..1350 to 1318..1370: black cut"}));
 }
 
+namespace {
+
+/// Two reels; the first gets four frames longer.
+const Film TwoReels = Film().at(1000).shot("A", 0, 100).at(3000).shot("B", 0, 50);
+const Film FirstReelGrown = Film().at(1000).shot("X", 0, 4).shot("A", 0, 100).at(3000).shot("B", 0, 50);
+
+} // namespace
+
+//  old    |- A -| tail                  leader pop |-- B --|
+//            |------------- clip -----------------------|
+//  new    |-- A --| tail                leader pop |-- B --|
+TEST_F(KeepPlannerTest, TailAndPopOfTwoReelsFollowEachItsOwnThoughAClipSpansTheGap)
+{
+    for (const SecondsRange& clip : {SecondsRange{1050, 3025}, SecondsRange{1100, 3000}, SecondsRange{1105, 2990}}) {
+        const KeepPlan plan = planFor(TwoReels, FirstReelGrown, {{2998, 2999}, clip, {1102, 1103}, {2985, 2997}});
+
+        EXPECT_EQ(linesOf(plan.events), (Lines{"1000..2981 to 1004..2985: cut black"}));
+        EXPECT_EQ(linesOf(plan.untouched), (Lines{"2985..3050 to 2985..3050: black unchanged"}));
+        EXPECT_EQ(linesOf(plan.lost), (Lines{"2981..2985"}));
+    }
+}
+
+TEST_F(KeepPlannerTest, WhereTheGapGetsLongerTheClipThatSpansItIsPartedBeforeTheLeader)
+{
+    const KeepPlan plan = planFor(FirstReelGrown, TwoReels, {{1000, 3050}, {2985, 2997}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1004..2985 to 1000..2981: cut black"}));
+    EXPECT_EQ(linesOf(plan.untouched), (Lines{"2985..3050 to 2985..3050: black unchanged"}));
+    EXPECT_EQ(linesOf(plan.lost), Lines());
+}
+
+TEST_F(KeepPlannerTest, WhereBothReelsMoveAlikeTheClipThatSpansTheGapIsNotCut)
+{
+    const Film after = Film().at(1010).append(TwoReels, 1000);
+
+    const KeepPlan plan = planFor(TwoReels, after, {{1050, 3025}, {1102, 1103}, {2985, 2997}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1000..3050 to 1010..3060: cut black cut"}));
+}
+
+// One clip of each reel, say of the old video, and the second begins where the first ends.
+TEST_F(KeepPlannerTest, OfClipsThatFillTheGapTogetherEachGoesWithItsOwnReel)
+{
+    const KeepPlan plan = planFor(TwoReels, FirstReelGrown, {{1000, 2500}, {2500, 3050}, {1102, 1103}, {2985, 2997}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1000..2500 to 1004..2504: cut black"}));
+    EXPECT_EQ(linesOf(plan.untouched), (Lines{"2504..3050 to 2504..3050: black unchanged"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"2500..2504"}));
+}
+
+//  old    |- A -|         sound         |-- B --|
+//           |------------- clip ------------|
+TEST_F(KeepPlannerTest, WhatStandsAwayFromBothReelsStaysThoughAClipSpansTheGap)
+{
+    const KeepPlan plan = planFor(TwoReels, FirstReelGrown, {{1050, 3025}, {2000, 2010}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1000..1996 to 1004..2000: cut black"}));
+    EXPECT_EQ(linesOf(plan.untouched), (Lines{"2000..3050 to 2000..3050: black unchanged"}));
+    EXPECT_EQ(linesOf(plan.lost), (Lines{"1996..2000"}));
+}
+
+TEST_F(KeepPlannerTest, AnotherReelThatNoCutSpeaksOfStaysThoughAClipRunsOverBoth)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100);
+    const Film after = Film().at(1000).shot("A", 0, 90);
+
+    const KeepPlan plan = planFor(before, after, {{1000, 7000}, {5000, 6000}, {1101, 1102}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"1100..5000 to 1090..4990: black"}));
+    EXPECT_EQ(linesOf(plan.untouched),
+              (Lines{"1000..1090 to 1000..1090: unchanged", "5000..7000 to 5000..7000: black"}));
+    EXPECT_EQ(linesOf(plan.lost), Lines());
+}
+
+TEST_F(KeepPlannerTest, AReelBeforeThatNoCutSpeaksOfStaysThoughAClipRunsOverBoth)
+{
+    const Film before = Film().at(5000).shot("A", 0, 100);
+    const Film after = Film().at(5010).shot("A", 0, 100);
+
+    const KeepPlan plan = planFor(before, after, {{1000, 5100}, {2000, 3000}});
+
+    EXPECT_EQ(linesOf(plan.events), (Lines{"3000..5100 to 3010..5110: black cut"}));
+    EXPECT_EQ(linesOf(plan.untouched), (Lines{"1000..3000 to 1000..3000: black"}));
+    EXPECT_EQ(linesOf(plan.lost), Lines());
+}
+
+TEST_F(KeepPlannerTest, FromAReelOnAClipSpansOnceItRunsOnFor60SecondsUnderItsPicture)
+{
+    const Film before = Film().at(1000).shot("A", 0, 100);
+    const Film after = Film().at(1000).shot("A", 0, 90);
+    const auto eventsWith = [&](double start, double end) {
+        return linesOf(planFor(before, after, {SecondsRange{start, end}, {1218, 1220}}).events);
+    };
+
+    // A clip of 59 seconds is a tail, and what stands less than 60 seconds after it goes along.
+    EXPECT_EQ(eventsWith(1099, 1159), (Lines{"1100..1220 to 1090..1210: black"}));
+    EXPECT_EQ(eventsWith(1099, 1160), (Lines{"1100..1160 to 1090..1150: black"}));
+    EXPECT_EQ(eventsWith(1100, 1160), (Lines{"1100..1220 to 1090..1210: black"}));
+}
+
 TEST_F(KeepPlannerTest, WhatStaysDoesNotWinOverPictureThatHasGrown)
 {
     const Film before = Film().at(1000).shot("A", 0, 100);

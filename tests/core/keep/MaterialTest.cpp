@@ -32,6 +32,15 @@ TEST(Material, AnInstantStandsOnOneFrame)
     EXPECT_EQ(linesOf(framesOfMaterial({{1.0, 1.0}, {3.02, 3.02}}, Framerate(24, 0))), (Lines{"24..25", "72..73"}));
 }
 
+TEST(Material, OneByOneTheyKeepTheirOrderAndOverlap)
+{
+    const std::vector<core::SecondsRange> material{{5.0, 8.0}, {1.0, 6.0}, {7.0, 7.0}};
+
+    const std::vector<core::FrameRange> expected{{5, 8}, {1, 6}, {7, 8}};
+    EXPECT_EQ(core::framesOfEach(material, FrameASecond), expected);
+    EXPECT_EQ(linesOf(framesOfMaterial(material, FrameASecond)), (Lines{"1..8"}));
+}
+
 TEST(Material, WhatIsNoStretchOfTimeIsRefused)
 {
     const double none = std::numeric_limits<double>::quiet_NaN();

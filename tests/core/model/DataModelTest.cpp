@@ -690,6 +690,45 @@ TEST_F(BehindAChange, AnEventThatIsInTheProgrammeTwiceStandsThereOnce)
     EXPECT_EQ(model.oldEventsFor(event).events(), (Events{a, b, c}));
 }
 
+TEST_F(BehindAChange, StandTheEventsAsTheyAreWhenItIsAsked)
+{
+    const auto event = change("00:00:22:00", "00:00:24:00", "00:02:00:00", "00:02:02:00");
+    const auto oldEvents = [&] { return model.oldEventsBehind({event}); };
+    ASSERT_EQ(oldEvents(), Events{b});
+
+    model.oldEdl().setListening(false);
+    b->setDst(Timecode("00:00:20:00"), Timecode("00:00:23:00"));
+    c->setDst(Timecode("00:00:23:00"), Timecode("00:00:40:00"));
+    EXPECT_EQ(oldEvents(), (Events{b, c}));
+    *b = EventBase();
+    b->addFlaw(core::EventFlaw::TimecodeInvalid);
+    EXPECT_EQ(oldEvents(), Events{c});
+    c->addFlaw(core::EventFlaw::TimecodeInvalid);
+    EXPECT_EQ(oldEvents(), Events());
+    c->removeFlaw(core::EventFlaw::TimecodeInvalid);
+    model.oldEdl().release();
+    EXPECT_EQ(oldEvents(), Events());
+    model.oldEdl() = model.newEdl();
+    EXPECT_EQ(oldEvents(), Events());
+    x->setDst(Timecode("00:00:20:00"), Timecode("00:00:30:00"));
+    EXPECT_EQ(oldEvents(), Events{x});
+}
+
+TEST_F(BehindAChange, StandTheEventsAtTheRateOfTheProject)
+{
+    const auto touching = makeEvent("D", "08:00:00:00", "08:00:10:00", "00:00:59:29", "00:01:00:02");
+    model.oldEdl().add(touching);
+    const auto event = change("00:00:59:00", "00:00:59:24", "00:01:50:00", "00:02:00:00");
+    ASSERT_EQ(model.oldEventsBehind({event}), Events());
+
+    project.framerate = Framerate(30, 0);
+    touching->setDst(Timecode("00:00:58:29"), Timecode("00:00:59:01"));
+    EXPECT_EQ(model.oldEventsBehind({event}), Events{touching});
+    project.framerate = Framerate(25, 0);
+    touching->revalidate();
+    EXPECT_EQ(model.oldEventsBehind({event}), Events());
+}
+
 TEST_F(BehindAChange, ManyChangesAreAnsweredAtOneGoAListForEach)
 {
     const auto first = change("00:00:15:00", "00:00:25:00", "00:01:50:00", "00:02:00:00");

@@ -103,9 +103,9 @@ public:
 /// "delete 5 at 10: TailTrimmed -5" of each step.
 std::string textOf(const PictureChange& change)
 {
-    static const char* const Words[] = {"head",           "tail",       "lifted",   "inserted", "replaced",
-                                        "moved",          "doubled",    "retimed",  "version",  "transition in",
-                                        "transition out", "transition", "unchanged"};
+    static const char* const Words[] = {"head",           "tail",       "lifted",    "inserted",  "replaced",
+                                        "moved",          "doubled",    "retimed",   "version",   "transition in",
+                                        "transition out", "transition", "unchanged", "reel later"};
     return std::string(Words[static_cast<int>(change.kind)]) + " " + std::to_string(change.frames);
 }
 
@@ -122,6 +122,9 @@ std::string textOf(const NoteStep& step)
         break;
     case StepAction::Relabel:
         text = std::to_string(step.inserted.length) + " again";
+        break;
+    case StepAction::MoveReel:
+        text = "reel";
         break;
     }
     text.append(" at ").append(std::to_string(step.place.frame)).append(":");
@@ -360,6 +363,49 @@ TEST_F(ChangeNotesTest, TheShotsOfANewDissolveMeetInItsMiddle)
     EXPECT_EQ(textOf(film.steps()), Texts{"-52 +12 at 54: transition in 12; tail -40;"});
 }
 
+TEST_F(ChangeNotesTest, AFreezeOfASourceFrameThatGetsLongerIsATrim)
+{
+    const Notes film(reelOf({{"A", 7, 17, 1}, {"B", 0, 50}}), reelOf({{"A", 7, 48, 1}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-0 +31 at 17: tail 31;"});
+}
+
+TEST_F(ChangeNotesTest, AFreezeOfNoSourceFramesIsTheSameFreeze)
+{
+    const Notes film(reelOf({{"A", 7, 17, 1}, {"B", 0, 50}}), reelOf({{"A", 7, 17, 0}, {"B", 0, 50}}));
+
+    EXPECT_TRUE(film.steps().empty());
+}
+
+TEST_F(ChangeNotesTest, TwoSourceFramesAreNoFreeze)
+{
+    const Notes film(reelOf({{"A", 7, 17, 2}, {"B", 0, 50}}), reelOf({{"A", 7, 48, 2}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-17 +48 at 0: retimed 48;"});
+}
+
+TEST_F(ChangeNotesTest, ASourceFrameThatIsSeenOnceIsNoFreeze)
+{
+    // Frame 7 alone, and then frames 7 and 8.
+    const Notes film(reelOf({{"A", 7, 1}, {"B", 0, 50}}), reelOf({{"A", 7, 2}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-0 +1 at 1: tail 1;"});
+}
+
+TEST_F(ChangeNotesTest, AFreezeOfAnotherFrameIsNoRetime)
+{
+    const Notes film(reelOf({{"A", 7, 17, 1}, {"B", 0, 50}}), reelOf({{"A", 8, 20, 1}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-17 +20 at 0: lifted 17; inserted 20;"});
+}
+
+TEST_F(ChangeNotesTest, AShotThatFreezesNowIsARetime)
+{
+    const Notes film(reelOf({{"A", 7, 17}, {"B", 0, 50}}), reelOf({{"A", 7, 17, 1}, {"B", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-17 +17 at 0: retimed 17;"});
+}
+
 TEST_F(ChangeNotesTest, AFreezeIsKeptAndItsEndIsTrimmed)
 {
     const Notes film(reelOf({{"A", 0, 100, 0}, {"B", 0, 50}}), reelOf({{"A", 0, 72, 0}, {"B", 0, 50}}));
@@ -565,7 +611,7 @@ TEST_F(ChangeNotesTest, AChangeInOneReelLeavesTheNextWhereItIs)
 
     ASSERT_EQ(film.notes.reels().size(), 2U);
     EXPECT_EQ(textOf(film.steps()), (Texts{"-10 +0 at 90: tail -10;", "-0 +7 at 100: inserted 7;"}));
-    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].place), 2 * Hour + 100);
+    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].place, 1), 2 * Hour + 100);
     EXPECT_EQ(film.notes.reels()[1].entries.front().runningOffset, 0);
 }
 
@@ -708,6 +754,250 @@ TEST_F(ChangeNotesTest, WhatCantBeTrustedIsDoubted)
     const decltype(doubts) expected{{Covered, 0}, {Nameless, 1}, {Reversed, 2}, {NoPicture, 3}, {Flawed, 4}};
     EXPECT_EQ(doubts, expected);
     EXPECT_TRUE(film.steps().empty());
+}
+
+TEST_F(ChangeNotesTest, ATimecodeThatDoesNotExistIsNoReversedEvent)
+{
+    EventList cut = reelOf({{"A", 0, 100}, {"B", 0, 50}});
+    cut.at(1).addFlaw(EventFlaw::TimecodeInvalid);
+    cut.at(1).addFlaw(EventFlaw::TimecodeRangeInvalid);
+    const Notes film(cut, cut);
+
+    ASSERT_EQ(film.notes.oldCut().doubts().size(), 1U);
+    EXPECT_EQ(film.notes.oldCut().doubts()[0].doubt, PictureDoubt::Flawed);
+}
+
+TEST_F(ChangeNotesTest, AReelThatBeginsElsewhereIsMovedThereFirst)
+{
+    // Leader comes before A, so that A stays where it was.
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 50}}), reelOf({{"L", 0, 200}, {"A", 0, 100}}, Hour - 200));
+
+    EXPECT_EQ(textOf(film.steps()),
+              (Texts{"reel at 0: reel later -200;", "-0 +200 at 0: inserted 200;", "-50 +0 at 300: lifted 50;"}));
+    EXPECT_EQ(film.notes.timecodeOf(film.steps()[2].place, 0), Hour + 100);
+    EXPECT_FALSE(film.notes.reels()[0].isUnchanged());
+    EXPECT_EQ(film.notes.totals().moved, 0);
+    EXPECT_EQ(film.notes.reels()[0].entries[0].number, 1U);
+    EXPECT_EQ(film.notes.reels()[0].entries[0].runningOffset, 0);
+}
+
+TEST_F(ChangeNotesTest, AReelThatOnlyBeginsElsewhereHasOneStep)
+{
+    const std::vector<Shot> shots{{"A", 0, 100}, {"B", 0, 50}};
+
+    EXPECT_EQ(textOf(Notes(reelOf(shots), reelOf(shots, 10 * Hour)).steps()),
+              Texts{"reel at 0: reel later " + std::to_string(9 * Hour) + ";"});
+}
+
+TEST_F(ChangeNotesTest, AMoveFromALaterReelIsCountedFromItsOldStart)
+{
+    EventList oldCut = reelOf({{"A", 0, 100}});
+    oldCut.append(reelOf({{"B", 0, 100}, {"M", 0, 20}, {"C", 0, 50}}, 2 * Hour));
+    EventList newCut = reelOf({{"A", 0, 100}, {"M", 0, 20}}, Hour + 7);
+    newCut.append(reelOf({{"B", 0, 100}, {"C", 0, 50}}, 3 * Hour));
+    const Notes film(oldCut, newCut);
+
+    ASSERT_EQ(textOf(film.steps()), (Texts{"reel at 0: reel later 7;", "20 from 100 at 100: moved 20;",
+                                           "reel at 0: reel later " + std::to_string(Hour) + ";"}));
+    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].from, 0), 2 * Hour + 100);
+    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].place, 0), Hour + 107);
+    EXPECT_EQ(film.notes.timecodeOf(film.notes.reels()[1].entries[2].moveEnd()->place, 1), 3 * Hour + 100);
+}
+
+/// A film of reels of one shot, each at its hour.
+EventList reelsOf(const std::vector<std::pair<std::string, int>>& rollsAndHours)
+{
+    EventList film;
+    for (const auto& [roll, hour] : rollsAndHours)
+        film.append(reelOf({{roll, 0, 100}}, hour * Hour));
+    return film;
+}
+
+/// "1 to 1", "gone 2", "new 3" of each pair of reels, counted from 1.
+Texts pairsOf(const Notes& film)
+{
+    Texts texts;
+    for (const ReelNotes& reel : film.notes.reels()) {
+        const auto& [oldReel, newReel] = reel.pair;
+        texts.push_back(!newReel   ? "gone " + std::to_string(*oldReel + 1)
+                        : !oldReel ? "new " + std::to_string(*newReel + 1)
+                                   : std::to_string(*oldReel + 1) + " to " + std::to_string(*newReel + 1));
+    }
+    return texts;
+}
+
+TEST_F(ChangeNotesTest, AReelThatIsGoneAndANewOneAtAnotherPlaceAreNoPair)
+{
+    EXPECT_EQ(pairsOf(Notes(reelsOf({{"A", 1}, {"X", 2}, {"B", 3}}), reelsOf({{"A", 1}, {"B", 3}, {"Y", 4}}))),
+              (Texts{"1 to 1", "3 to 2", "new 3", "gone 2"}));
+}
+
+TEST_F(ChangeNotesTest, ReelsWithoutCommonPictureThatBeginAtTheSameTimeAreAPair)
+{
+    EXPECT_EQ(pairsOf(Notes(reelsOf({{"A", 1}, {"X", 2}}), reelsOf({{"Y", 2}, {"A", 3}}))),
+              (Texts{"2 to 1", "1 to 2"}));
+}
+
+TEST_F(ChangeNotesTest, ReelsWithoutCommonPictureBetweenTheSameReelsArePairs)
+{
+    EXPECT_EQ(pairsOf(Notes(reelsOf({{"A", 1}, {"X", 2}, {"W", 4}, {"B", 6}}),
+                            reelsOf({{"A", 1}, {"Y", 3}, {"Z", 5}, {"B", 6}}))),
+              (Texts{"1 to 1", "2 to 2", "3 to 3", "4 to 4"}));
+    // One more between them.
+    EXPECT_EQ(
+        pairsOf(Notes(reelsOf({{"A", 1}, {"X", 2}, {"B", 6}}), reelsOf({{"A", 1}, {"Y", 3}, {"Z", 5}, {"B", 6}}))),
+        (Texts{"1 to 1", "new 2", "new 3", "3 to 4", "gone 2"}));
+    EXPECT_EQ(pairsOf(Notes(reelsOf({{"X", 1}}), reelsOf({{"Y", 2}}))), Texts{"1 to 1"});
+}
+
+/// Shots with frames without picture between them; a roll of "" is a gap.
+EventList withGaps(const std::vector<Shot>& shots)
+{
+    EventList events;
+    int start = Hour;
+    for (const Shot& shot : shots) {
+        if (!shot.roll.empty())
+            events.add(eventOf(shot, start, static_cast<unsigned>(events.size()) + 1));
+        start += shot.length;
+    }
+    return events;
+}
+
+TEST_F(ChangeNotesTest, AGapWithinASceneMovesAlong)
+{
+    const Notes film(
+        withGaps({{"A", 0, 500}, {"B", 0, 50}, {"", 0, 24}, {"C", 0, 50}, {"", 0, 12}, {"D", 0, 50}, {"E", 0, 300}}),
+        withGaps({{"B", 0, 50}, {"", 0, 24}, {"C", 0, 50}, {"", 0, 12}, {"D", 0, 50}, {"A", 0, 500}, {"E", 0, 300}}));
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"186 from 500 at 0: moved 186;"});
+    EXPECT_EQ(film.steps()[0].changes[0].shots, 3);
+    EXPECT_EQ(film.notes.totals().lifted, 0);
+}
+
+TEST_F(ChangeNotesTest, AGapBeforeOrAfterAShotMovesAlong)
+{
+    EXPECT_EQ(textOf(Notes(withGaps({{"A", 0, 500}, {"B", 0, 90}, {"", 0, 24}, {"C", 0, 50}, {"D", 0, 80}}),
+                           withGaps({{"A", 0, 500}, {"", 0, 24}, {"C", 0, 50}, {"B", 0, 90}, {"D", 0, 80}}))
+                         .steps()),
+              Texts{"74 from 590 at 500: moved 74;"});
+    EXPECT_EQ(textOf(Notes(withGaps({{"A", 0, 500}, {"B", 0, 90}, {"C", 0, 50}, {"", 0, 24}, {"D", 0, 80}}),
+                           withGaps({{"A", 0, 500}, {"C", 0, 50}, {"", 0, 24}, {"B", 0, 90}, {"D", 0, 80}}))
+                         .steps()),
+              Texts{"74 from 590 at 500: moved 74;"});
+}
+
+TEST_F(ChangeNotesTest, AGapOfAnotherLengthIsReplacedAtItsNewPlace)
+{
+    const Notes film(withGaps({{"A", 0, 500}, {"B", 0, 50}, {"", 0, 24}, {"C", 0, 50}, {"E", 0, 300}}),
+                     withGaps({{"B", 0, 50}, {"", 0, 23}, {"C", 0, 50}, {"A", 0, 500}, {"E", 0, 300}}));
+
+    EXPECT_EQ(textOf(film.steps()), (Texts{"124 from 500 at 0: moved 124;", "-24 +23 at 50: lifted 24; inserted 23;"}));
+    EXPECT_EQ(film.steps()[0].changes[0].shots, 2);
+}
+
+TEST_F(ChangeNotesTest, DoubledPictureTellsHowManyShotsItIs)
+{
+    const Notes film(
+        reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 40}, {"D", 0, 9}}),
+        reelOf({{"A", 0, 100}, {"B", 0, 50}, {"C", 0, 40}, {"D", 0, 9}, {"A", 0, 100}, {"B", 0, 50}, {"C", 0, 40}}));
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"-0 +190 at 199: doubled 190;"});
+    EXPECT_EQ(film.steps()[0].changes[0].shots, 3);
+}
+
+TEST_F(ChangeNotesTest, ADoubledShotOfAnotherVersionIsAChangeOfItsOwn)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"VFX_1", 0, 50}, {"C", 0, 40}, {"D", 0, 9}}),
+                     reelOf({{"A", 0, 100},
+                             {"VFX_1", 0, 50},
+                             {"C", 0, 40},
+                             {"D", 0, 9},
+                             {"A", 0, 100},
+                             {"VFX_2", 0, 50},
+                             {"C", 0, 40}}),
+                     0, "VFX_");
+
+    ASSERT_EQ(textOf(film.steps()), Texts{"-0 +190 at 199: doubled 100; doubled 50; doubled 40;"});
+    const auto doubledFrom = film.steps()[0].doubledFrom;
+    EXPECT_EQ(doubledFrom, (std::vector<WorkPlace>{{0, 0}, {0, 100}, {0, 150}}));
+    EXPECT_EQ(film.steps()[0].changes[1].oldShot->rollName(), "VFX_1");
+    EXPECT_EQ(film.steps()[0].changes[1].newShot->rollName(), "VFX_2");
+}
+
+/// The transitions of a step's changes: "old", "new" or "old new" of each.
+Texts transitionsOf(const Notes& film)
+{
+    Texts texts;
+    for (const NoteStep& step : film.steps()) {
+        for (const PictureChange& change : step.changes)
+            texts.push_back(std::string(change.hasOldTransition ? "old" : "") + (change.hasNewTransition ? "new" : ""));
+    }
+    return texts;
+}
+
+TEST_F(ChangeNotesTest, AShotThatComesOrGoesWithItsDissolveTellsOfIt)
+{
+    const std::vector<Shot> without{{"A", 0, 100}, {"B", 0, 50}};
+    const std::vector<Shot> with{{"A", 0, 100}, {"X", 0, 60, -1, 16}, {"B", 0, 50}};
+    const Notes in(reelOf(without), reelOf(with));
+    const Notes out(reelOf(with), reelOf(without));
+
+    EXPECT_EQ(textOf(in.steps()), Texts{"-0 +60 at 100: inserted 60;"});
+    EXPECT_EQ(transitionsOf(in), Texts{"new"});
+    EXPECT_EQ(textOf(out.steps()), Texts{"-60 +0 at 100: lifted 60;"});
+    EXPECT_EQ(transitionsOf(out), Texts{"old"});
+}
+
+TEST_F(ChangeNotesTest, AShotReplacedWithItsDissolveTellsOfBoth)
+{
+    const std::vector<Shot> cut{{"A", 0, 100}, {"X", 0, 60}, {"B", 0, 50}};
+    const std::vector<Shot> dissolve{{"A", 0, 100}, {"Y", 0, 60, -1, 16}, {"B", 0, 50}};
+    const std::vector<Shot> longer{{"A", 0, 100}, {"Z", 0, 60, -1, 24}, {"B", 0, 50}};
+
+    EXPECT_EQ(transitionsOf(Notes(reelOf(cut), reelOf(dissolve))), Texts{"new"});
+    EXPECT_EQ(transitionsOf(Notes(reelOf(dissolve), reelOf(cut))), Texts{"old"});
+    EXPECT_EQ(transitionsOf(Notes(reelOf(dissolve), reelOf(longer))), Texts{"oldnew"});
+    EXPECT_EQ(textOf(Notes(reelOf(dissolve), reelOf(longer)).steps()), Texts{"-60 +60 at 100: replaced 60;"});
+}
+
+TEST_F(ChangeNotesTest, ADissolveThatIsRemovedIsThatOfTheShotThatHadIt)
+{
+    // C came out of B by a dissolve, and goes after D with a cut.
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 90}, {"C", 0, 80, -1, 16}, {"D", 0, 500}}),
+                     reelOf({{"A", 0, 100}, {"B", 0, 90}, {"D", 0, 500}, {"C", 0, 80}}));
+
+    // B ends 8 frames earlier and C begins 8 frames later than in the middle of the dissolve, and then 16 earlier.
+    ASSERT_EQ(textOf(film.steps()), (Texts{"-16 +0 at 190: transition out 0; tail -8; head -8;",
+                                           "64 from 190 at 690: moved 64;", "-0 +16 at 690: head 16;"}));
+    const auto changes = film.steps()[0].changes;
+    EXPECT_EQ(changes[0].oldShot->rollName(), "C");
+    EXPECT_EQ(changes[0].newShot->rollName(), "C");
+    EXPECT_EQ(changes[1].newShot->rollName(), "B");
+    EXPECT_EQ(changes[2].oldShot->rollName(), "C");
+}
+
+TEST_F(ChangeNotesTest, AShotThatIsNotInADissolveIsNotTrimmedByIt)
+{
+    // B goes, out of which C came by a dissolve.
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 90}, {"C", 0, 80, -1, 16}, {"D", 0, 50}}),
+                     reelOf({{"A", 0, 100}, {"C", 16, 64}, {"D", 0, 50}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-106 +0 at 100: transition out 0; lifted 90; head -8;"});
+}
+
+TEST_F(ChangeNotesTest, ADissolveOfTheSameLengthAtALaterPlaceTellsTheTrims)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 90, -1, 24}}), reelOf({{"A", 0, 112}, {"B", 12, 78, -1, 24}}));
+
+    EXPECT_EQ(textOf(film.steps()), Texts{"-36 +36 at 100: transition 24; tail 12; head -12;"});
+}
+
+TEST_F(ChangeNotesTest, ADissolveOfOneLineIsComparedWithItsOutgoingShot)
+{
+    const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 90, -1, 24}}), reelOf({{"C", 0, 100}, {"B", 0, 90, -1, 24}}));
+
+    EXPECT_EQ(film.notes.totals().kept, 66);
+    EXPECT_EQ(textOf(film.steps()), Texts{"-124 +124 at 0: transition 24; replaced 100;"});
 }
 
 TEST_F(ChangeNotesTest, TwoEmptyListsHaveNothingToTell)

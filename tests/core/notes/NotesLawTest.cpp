@@ -174,6 +174,51 @@ RC_GTEST_PROP(NotesLaw, TheOffsetsEndInTheChangeOfLength, ())
     }
 }
 
+/// A timecode that isn't that of the place at its step, or nothing.
+std::string wrongTimecode(const ChangeNotes& notes, const NotesPlayer& player, const NoteEntry& entry, std::size_t reel)
+{
+    std::vector<WorkPlace> places;
+    if (const MoveEnd* const end = entry.moveEnd())
+        places = {end->place};
+    if (const NoteStep* const step = entry.step()) {
+        places = step->doubledFrom;
+        if (step->action != StepAction::MoveReel)
+            places.push_back(step->place);
+        if (step->action == StepAction::Move)
+            places.push_back(step->from);
+    }
+    for (const WorkPlace& place : places) {
+        if (notes.timecodeOf(place, reel) != player.timecodeAt(place))
+            return "reel " + std::to_string(place.reel) + ", frame " + std::to_string(place.frame) + " is at " +
+                   std::to_string(player.timecodeAt(place)) + " and not " +
+                   std::to_string(notes.timecodeOf(place, reel));
+    }
+    return {};
+}
+
+RC_GTEST_PROP(NotesLaw, TheTimecodesAreThoseOfTheProgrammeSoFar, ())
+{
+    const auto seed = *genRecutSeed();
+    const RandomRecut film(seed);
+    const TestProject project(film.rules.framerate);
+    const ChangeNotes notes(film.oldCut, film.newCut, film.rules);
+    std::vector<ReelChange> reels;
+    for (const ReelNotes& reel : notes.reels())
+        reels.push_back(reel.pair);
+    NotesPlayer player(film.oldCut, film.newCut, film.rules, reels);
+
+    for (std::size_t reel = 0; reel < reels.size(); ++reel) {
+        for (const NoteEntry& entry : notes.reels()[reel].entries) {
+            const std::string wrong = wrongTimecode(notes, player, entry, reel);
+            RC_LOG() << wrong;
+            RC_ASSERT(wrong.empty());
+            if (entry.step() != nullptr)
+                player.carryOut(*entry.step());
+        }
+    }
+    RC_ASSERT(player.difference().empty());
+}
+
 /// The EDLs of the tree.
 std::vector<std::string> edlsOfTheTree()
 {

@@ -25,7 +25,9 @@ namespace {
 
 constexpr int GapBetweenReels = 60; // seconds
 
-std::string transitionText(const EventList& events, std::size_t index, const PictureRules& rules)
+/// `before` is the event that is seen right before this one, or null.
+std::string transitionText(const EventList& events, std::size_t index, const EventBase* before,
+                           const PictureRules& rules)
 {
     const EventBase& event = events.at(index);
     std::string text = std::to_string(event.transitionType()) + " of " + std::to_string(event.transitionDuration()) +
@@ -34,10 +36,20 @@ std::string transitionText(const EventList& events, std::size_t index, const Pic
     if (index > 0 && events.at(index - 1).eventNumber() == event.eventNumber())
         text += " out of " + core::nameBy(rules.matchBy, events.at(index - 1)) + " at " +
                 events.at(index - 1).srcOut().toString();
+    else if (before != nullptr && before->dstOut() == event.dstIn())
+        text += " out of " + core::nameBy(rules.matchBy, *before) + " at " + before->srcOut().toString();
     return text;
 }
 
-SeenFrame frameOf(const EventList& events, std::size_t index, int frame, const PictureRules& rules)
+bool isFrozen(const EventBase& event, const PictureRules& rules)
+{
+    const auto count = [&rules](const core::Timecode& timecode) { return timecode.toFrameCount(rules.framerate); };
+    const int source = count(event.srcOut()) - count(event.srcIn());
+    return source == 0 || (source == 1 && count(event.dstOut()) - count(event.dstIn()) > 1);
+}
+
+SeenFrame frameOf(const EventList& events, std::size_t index, const EventBase* before, int frame,
+                  const PictureRules& rules)
 {
     const EventBase& event = events.at(index);
     const std::string& name = core::nameBy(rules.matchBy, event);
@@ -47,8 +59,8 @@ SeenFrame frameOf(const EventList& events, std::size_t index, int frame, const P
                     std::to_string(event.transitionDuration()) + name,
                 static_cast<double>(frame)};
     if (event.isTransition() && frame < event.transitionDuration())
-        return {transitionText(events, index, rules), static_cast<double>(frame)};
-    if (std::abs(event.motionSpeed()) < 0.01)
+        return {transitionText(events, index, before, rules), static_cast<double>(frame)};
+    if (isFrozen(event, rules))
         return {name + " frozen at " + event.srcIn().toString(), static_cast<double>(frame)};
     const double speed = event.isNormalSpeed() ? 1.0 : event.motionSpeed();
     return {name, event.srcIn().toFrameCount(rules.framerate) + frame * speed, speed};
@@ -67,7 +79,7 @@ bool SeenFrame::looksLike(const SeenFrame& other) const
            std::abs(source - other.source) <= std::abs(speed) + std::abs(speed - other.speed) * LongestShot;
 }
 
-std::vector<std::vector<SeenFrame>> framesOf(const EventList& events, const PictureRules& rules)
+std::vector<SeenReel> framesOf(const EventList& events, const PictureRules& rules)
 {
     std::vector<std::size_t> order;
     for (std::size_t index = 0; index < events.size(); ++index) {
@@ -78,22 +90,28 @@ std::vector<std::vector<SeenFrame>> framesOf(const EventList& events, const Pict
     }
     std::stable_sort(order.begin(), order.end(),
                      [&](std::size_t a, std::size_t b) { return events.at(a).dstIn() < events.at(b).dstIn(); });
-    std::map<int, SeenFrame> painted;
+    std::map<int, std::size_t> painted;
     for (const std::size_t index : order) {
         const int in = events.at(index).dstIn().toFrameCount(rules.framerate);
         const int out = events.at(index).dstOut().toFrameCount(rules.framerate);
         for (int frame = in; frame < out; ++frame)
-            painted[frame] = frameOf(events, index, frame - in, rules);
+            painted[frame] = index;
     }
-    std::vector<std::vector<SeenFrame>> reels;
+    std::map<std::size_t, const EventBase*> before; // what is seen before each event
+    for (const auto& [frame, index] : painted) {
+        const auto frameBefore = painted.find(frame - 1);
+        before.emplace(index, frameBefore == painted.end() ? nullptr : &events.at(frameBefore->second));
+    }
+    std::vector<SeenReel> reels;
     int next = 0;
-    for (const auto& [frame, seen] : painted) {
+    for (const auto& [frame, index] : painted) {
         if (reels.empty() || frame - next >= GapBetweenReels * rules.framerate.framesPerSecond)
-            reels.emplace_back();
+            reels.push_back({frame, {}});
         else
             for (int gap = next; gap < frame; ++gap)
-                reels.back().push_back({"gap", static_cast<double>(gap - next)});
-        reels.back().push_back(seen);
+                reels.back().frames.push_back({"gap", static_cast<double>(gap - next)});
+        const int in = events.at(index).dstIn().toFrameCount(rules.framerate);
+        reels.back().frames.push_back(frameOf(events, index, before.at(index), frame - in, rules));
         next = frame + 1;
     }
     return reels;
@@ -106,8 +124,8 @@ NotesPlayer::NotesPlayer(const EventList& oldCut, const EventList& newCut, const
     const auto newReels = framesOf(newCut, rules);
     std::vector<int> used(oldReels.size(), 0);
     for (const ReelChange& pair : reels) {
-        m_reels.push_back(pair.oldReel ? oldReels.at(*pair.oldReel) : std::vector<SeenFrame>());
-        m_goal.push_back(pair.newReel ? newReels.at(*pair.newReel) : std::vector<SeenFrame>());
+        m_reels.push_back(pair.oldReel ? oldReels.at(*pair.oldReel) : SeenReel{newReels.at(*pair.newReel).start, {}});
+        m_goal.push_back(pair.newReel ? newReels.at(*pair.newReel) : SeenReel{oldReels.at(*pair.oldReel).start, {}});
         if (pair.oldReel)
             ++used.at(*pair.oldReel);
     }
@@ -115,13 +133,13 @@ NotesPlayer::NotesPlayer(const EventList& oldCut, const EventList& newCut, const
         if (count != 1)
             throw std::logic_error("an old reel is used " + std::to_string(count) + " times");
     }
-    for (const auto& reel : newReels)
-        m_newFrames.insert(m_newFrames.end(), reel.begin(), reel.end());
+    for (const auto& [start, frames] : newReels)
+        m_newFrames.insert(m_newFrames.end(), frames.begin(), frames.end());
 }
 
 void NotesPlayer::carryOut(const NoteStep& step)
 {
-    auto& reel = m_reels.at(step.place.reel);
+    auto& reel = m_reels.at(step.place.reel).frames;
     const auto check = [](bool isPossible) {
         if (!isPossible)
             throw std::logic_error("a step can't be carried out");
@@ -145,11 +163,15 @@ void NotesPlayer::carryOut(const NoteStep& step)
         break;
     case StepAction::Move:
         check(step.moved > 0);
-        insert(step.place.frame, cutOut(m_reels.at(step.from.reel), step.from.frame, step.moved));
+        insert(step.place.frame, cutOut(m_reels.at(step.from.reel).frames, step.from.frame, step.moved));
         break;
     case StepAction::Relabel:
         cutOut(reel, step.place.frame, step.inserted.length);
         insert(step.place.frame, fromNewCut);
+        break;
+    case StepAction::MoveReel:
+        check(step.place.frame == 0 && step.changes.front().frames != 0);
+        m_reels.at(step.place.reel).start += step.changes.front().frames;
         break;
     }
 }
@@ -158,14 +180,17 @@ std::string NotesPlayer::difference() const
 {
     for (std::size_t index = 0; index < m_reels.size(); ++index) {
         const std::string where = "reel " + std::to_string(index);
-        if (m_reels[index].size() != m_goal[index].size())
-            return where + " has " + std::to_string(m_reels[index].size()) + " frames and not " +
-                   std::to_string(m_goal[index].size());
-        for (std::size_t frame = 0; frame < m_reels[index].size(); ++frame) {
-            if (!m_reels[index][frame].looksLike(m_goal[index][frame]))
-                return where + ", frame " + std::to_string(frame) + ": " + m_reels[index][frame].what + " " +
-                       std::to_string(m_reels[index][frame].source) + " and not " + m_goal[index][frame].what + " " +
-                       std::to_string(m_goal[index][frame].source);
+        const auto& [start, frames] = m_reels[index];
+        const auto& [goalStart, goal] = m_goal[index];
+        if (start != goalStart)
+            return where + " begins at " + std::to_string(start) + " and not " + std::to_string(goalStart);
+        if (frames.size() != goal.size())
+            return where + " has " + std::to_string(frames.size()) + " frames and not " + std::to_string(goal.size());
+        for (std::size_t frame = 0; frame < frames.size(); ++frame) {
+            if (!frames[frame].looksLike(goal[frame]))
+                return where + ", frame " + std::to_string(frame) + ": " + frames[frame].what + " " +
+                       std::to_string(frames[frame].source) + " and not " + goal[frame].what + " " +
+                       std::to_string(goal[frame].source);
         }
     }
     return {};
@@ -173,17 +198,17 @@ std::string NotesPlayer::difference() const
 
 bool NotesPlayer::isDoneBefore(const core::WorkPlace& place) const
 {
-    const auto& reel = m_reels.at(place.reel);
-    const auto& goal = m_goal.at(place.reel);
+    const auto& [start, frames] = m_reels.at(place.reel);
+    const auto& [goalStart, goal] = m_goal.at(place.reel);
     const auto count = static_cast<std::size_t>(place.frame);
-    return count <= reel.size() && count <= goal.size() &&
-           std::equal(reel.begin(), reel.begin() + place.frame, goal.begin(),
+    return start == goalStart && count <= frames.size() && count <= goal.size() &&
+           std::equal(frames.begin(), frames.begin() + place.frame, goal.begin(),
                       [](const SeenFrame& a, const SeenFrame& b) { return a.looksLike(b); });
 }
 
 bool NotesPlayer::showsAt(const core::WorkPlace& place, int newStart) const
 {
-    const SeenFrame& seen = m_reels.at(place.reel).at(static_cast<std::size_t>(place.frame));
+    const SeenFrame& seen = m_reels.at(place.reel).frames.at(static_cast<std::size_t>(place.frame));
     SeenFrame wanted = m_newFrames.at(static_cast<std::size_t>(newStart));
     if (wanted.what.find("VFX") != std::string::npos && seen.what.find("VFX") != std::string::npos)
         wanted.what = seen.what;

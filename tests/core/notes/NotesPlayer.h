@@ -22,8 +22,13 @@ struct SeenFrame {
     bool looksLike(const SeenFrame& other) const;
 };
 
+struct SeenReel {
+    int start = 0; ///< the frame count of the timecode of its first frame
+    std::vector<SeenFrame> frames;
+};
+
 /// The frames of a programme, reel by reel. It is painted event by event and frame by frame.
-std::vector<std::vector<SeenFrame>> framesOf(const core::EventList& events, const core::PictureRules& rules);
+std::vector<SeenReel> framesOf(const core::EventList& events, const core::PictureRules& rules);
 
 /// Carries steps out on the frames of the old cut as an assistant does it by hand, and looks up what has to be inserted in
 /// the new cut.
@@ -33,16 +38,18 @@ public:
                 const std::vector<core::ReelChange>& reels);
 
     void carryOut(const core::NoteStep& step);
-    /// Empty when all reels are as in the new cut, else where they differ first.
+    /// Empty when all reels are and begin as in the new cut, else where they differ first.
     std::string difference() const;
     /// Whether the frames before a place are already those of the new cut.
     bool isDoneBefore(const core::WorkPlace& place) const;
     /// Whether the frames at a place look like those of the new cut from `newStart` on, whatever their version.
     bool showsAt(const core::WorkPlace& place, int newStart) const;
+    /// The frame count of the timecode at which a place stands now.
+    int timecodeAt(const core::WorkPlace& place) const { return m_reels.at(place.reel).start + place.frame; }
 
 private:
-    std::vector<std::vector<SeenFrame>> m_goal; ///< by pairs of reels; empty for one that goes
-    std::vector<std::vector<SeenFrame>> m_reels;
+    std::vector<SeenReel> m_goal; ///< by pairs of reels; empty for one that goes
+    std::vector<SeenReel> m_reels;
     std::vector<SeenFrame> m_newFrames;
 };
 

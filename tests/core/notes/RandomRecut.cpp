@@ -25,6 +25,8 @@ namespace {
 
 using Random = std::mt19937_64;
 
+constexpr int FirstHour = 90000; // frames at 25 frames a second
+
 int below(Random& random, int count)
 {
     return static_cast<int>(random() % static_cast<std::uint64_t>(count));
@@ -93,30 +95,30 @@ std::shared_ptr<EventBase> eventOf(const Shot& shot, int srcIn, int srcOut, int 
     return event;
 }
 
-EventList listOf(const std::vector<Shot>& shots)
+EventList listOf(const std::vector<Shot>& shots, int start = FirstHour)
 {
     EventList events;
-    int end = 90000;
+    int end = start;
     unsigned number = 0;
     std::string before = "BL";
     for (const Shot& shot : shots) {
-        const int start = std::max(0, end + shot.gapBefore);
+        const int in = std::max(0, end + shot.gapBefore);
         ++number;
         if (shot.hasTwoLines) {
             Shot outgoing;
             outgoing.roll = before;
-            events.add(eventOf(outgoing, 500, 500, start, start, number));
+            events.add(eventOf(outgoing, 500, 500, in, in, number));
         }
         const int last = Timecode::framerate().lastFrame;
         const int srcIn = std::clamp(shot.srcIn, 0, last);
         const int srcOut = std::min(srcIn + shot.srcLength, last);
-        const auto event = eventOf(shot, srcIn, srcOut, start, start + shot.length, number);
+        const auto event = eventOf(shot, srcIn, srcOut, in, in + shot.length, number);
         event->setTransitionType(shot.transitionType);
         event->setTransitionDuration(shot.transitionDuration);
         if (shot.flaw)
             event->addFlaw(*shot.flaw);
         events.add(event);
-        end = start + shot.length;
+        end = in + shot.length;
         before = shot.roll;
     }
     return events;
@@ -233,7 +235,9 @@ RandomRecut::RandomRecut(const RecutSeed& seed)
         Random random(number);
         change(shots, random, rollCount);
     }
-    newCut = listOf(shots);
+    // One cut in three begins elsewhere.
+    constexpr int Most = 10000;
+    newCut = listOf(shots, FirstHour + (below(setting, 3) == 0 ? below(setting, 2 * Most) - Most : 0));
 }
 
 EventList recutOf(const EventList& events, const Framerate& framerate, std::uint64_t seed)

@@ -24,7 +24,8 @@ rc::Gen<RecutSeed> genRecutSeed();
 
 /// An old and a new cut of a small film: the same rolls again and again, transitions of one and two lines, retimes, freezes,
 /// gaps, reels, events on top of each other, flaws; and between the two cuts trims, lifts, inserts, moves, doubles, slips,
-/// new speeds and versions, other transitions.
+/// new speeds and versions, other transitions, and reels that begin
+/// elsewhere.
 struct RandomRecut {
     explicit RandomRecut(const RecutSeed& seed);
 

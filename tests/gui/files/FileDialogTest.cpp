@@ -276,6 +276,18 @@ TEST_F(FileDialogTest, KeepsWhatItHasWhenNothingIsChosen)
     EXPECT_EQ(rangeText("DST"), "01:00:00:00 01:00:05:00");
 }
 
+TEST_F(FileDialogTest, StaysAsItIsWhenNothingIsChosenAtFirst)
+{
+    m_dialog->showForChangeList();
+    enter("DST", "00:00:01:00");
+
+    choose({});
+
+    EXPECT_EQ(rangeText("DST"), "00:00:00:00 00:00:00:00");
+    EXPECT_EQ(rangeText("SRC"), "00:00:00:00 00:00:00:00");
+    EXPECT_EQ(offsetText("DST"), "+00:00:01:00");
+}
+
 TEST_F(FileDialogTest, RenamesBRollsAsTheSettingsSay)
 {
     const std::string path =

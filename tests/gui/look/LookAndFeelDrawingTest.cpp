@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "gui/look/ButtonTile.h"
 #include "gui/look/LookAndFeel.h"
 #include "gui/look/Text.h"
 #include "gui/table/EventColumn.h"
@@ -7,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <functional>
 
@@ -132,7 +134,8 @@ TEST_F(LookAndFeelDrawingTest, MarksAButtonThatIsOnWithADarkBarBesideItsColour)
     EXPECT_GT(on.getPixelAt(20, 15).getBrightness(), 0.4F);
     EXPECT_GT(on.getPixelAt(20, 18).getBrightness(), 0.4F);
     button.setEnabled(false);
-    EXPECT_LT(drawnButton(button, false).getPixelAt(20, 16).getBrightness(), off.getPixelAt(20, 16).getBrightness());
+    const juce::Image disabled = drawnButton(button, false);
+    EXPECT_GT(disabled.getPixelAt(20, 16).getBrightness(), disabled.getPixelAt(20, 15).getBrightness() + 0.2F);
 }
 
 TEST_F(LookAndFeelDrawingTest, ShadesAPressedToggleInItsOnColour)
@@ -158,19 +161,51 @@ TEST_F(LookAndFeelDrawingTest, DrawsTheButtonOfAComboBoxInItsColour)
     EXPECT_EQ(image.getPixelAt(38, 18), juce::Colour(10, 200, 30));
 }
 
-TEST_F(LookAndFeelDrawingTest, FadesADisabledButton)
+TEST_F(LookAndFeelDrawingTest, SinksADisabledButton)
 {
     juce::TextButton button;
     button.setEnabled(false);
 
     const juce::Image image = drawnButton(button, false);
 
-    // Half black on white, and on it half of the shade.
-    expectNear(image.getPixelAt(20, 0), {128, 128, 128});
-    expectNear(image.getPixelAt(20, 1), {141, 143, 145});
+    // Half of the frame's colour and half of black, on white.
+    expectNear(image.getPixelAt(20, 0), {187, 188, 189});
+    for (const int y : {1, 10, 18})
+        expectNear(image.getPixelAt(20, y), {128, 128, 128});
 }
 
-TEST_F(LookAndFeelDrawingTest, WritesButtonsInTheColourOfTheirStateAndHalfAsStrongWhenDisabled)
+/// As WCAG 2 defines it: from 1 for the same colour to 21.
+double contrastOf(juce::Colour a, juce::Colour b)
+{
+    const auto linear = [](float channel) {
+        return channel <= 0.04045F ? channel / 12.92 : std::pow((channel + 0.055) / 1.055, 2.4);
+    };
+    const auto luminance = [&](juce::Colour colour) {
+        return 0.2126 * linear(colour.getFloatRed()) + 0.7152 * linear(colour.getFloatGreen()) +
+               0.0722 * linear(colour.getFloatBlue());
+    };
+    const double low = std::min(luminance(a), luminance(b));
+    const double high = std::max(luminance(a), luminance(b));
+    return (high + 0.05) / (low + 0.05);
+}
+
+TEST_F(LookAndFeelDrawingTest, LetsTheTextOfADisabledButtonBeReadOnEachGround)
+{
+    juce::TextButton button("Generate");
+    button.setSize(80, 24);
+    button.setEnabled(false);
+    for (const PaletteColour ground : {Palette::band, Palette::panel, Palette::sheet, opaque(7, 12, 16)}) {
+        juce::Image image(juce::Image::RGB, 80, 24, false);
+        juce::Graphics graphics(image);
+        graphics.fillAll(toColour(ground));
+        button.paintEntireComponent(graphics, true);
+        const juce::Colour tile = image.getPixelAt(6, 12);
+
+        EXPECT_GE(contrastOf(tile, tile.overlaidWith(disabledInk())), 3.0) << tile.toString();
+    }
+}
+
+TEST_F(LookAndFeelDrawingTest, WritesButtonsInTheColourOfTheirStateAndDisabledOnesInALightOne)
 {
     juce::TextButton button("HHHHH");
     button.setSize(80, 20);
@@ -194,7 +229,8 @@ TEST_F(LookAndFeelDrawingTest, WritesButtonsInTheColourOfTheirStateAndHalfAsStro
     button.setToggleState(true, juce::dontSendNotification);
     expectNear(darkest(), juce::Colours::blue);
     button.setEnabled(false);
-    EXPECT_NEAR(darkest().getRed(), 127, 6);
+    // 70 % of 201, 211, 220 on white.
+    expectNear(darkest(), {217, 224, 231});
     EXPECT_EQ(m_look.getTextButtonFont(button, 20), getFont(6));
 }
 

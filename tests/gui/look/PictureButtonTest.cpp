@@ -34,6 +34,18 @@ protected:
 
 } // namespace
 
+TEST_F(PictureButtonTest, KeepsTheTitleThatItHas)
+{
+    PictureButton button("Clear Old Edl Button", Symbol::Bin);
+    button.setTooltip("Delete EDL");
+    button.setTooltip("The Old EDL is empty.");
+    EXPECT_EQ(button.getTitle(), "Delete EDL");
+
+    button.setTitle("Old EDL, Delete EDL");
+    button.setTooltip("Delete EDL");
+    EXPECT_EQ(button.getTitle(), "Old EDL, Delete EDL");
+}
+
 TEST_F(PictureButtonTest, HasItsTooltipAsTitle)
 {
     PictureButton button("Load Old Edl Button", Symbol::Plus);

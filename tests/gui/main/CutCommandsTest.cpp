@@ -105,6 +105,34 @@ TEST_F(CutCommandsTest, TellWhyNoChangeEdlCouldBeMade)
     EXPECT_EQ(m_undo.entries, Names{L"Generate Change EDL"});
 }
 
+TEST_F(CutCommandsTest, TellWhichEventsWerePassedOver)
+{
+    // 2512 frames of source fill 2500 frames up to the last frame of the day: the speed counts as normal, so that the stretch
+    // is taken to be as long as the source and would end after midnight.
+    for (core::EventList* const cut : {&m_model.oldEdl(), &m_model.newEdl()}) {
+        cut->add(makeEvent("A001", "10:00:00:00", "10:00:10:00", "01:00:00:00", "01:00:10:00", 1));
+        cut->add(makeEvent("A009", "01:00:00:00", "01:01:40:12", "23:58:19:24", "23:59:59:24", 7));
+        cut->at(1).setEdlFileName("reel3.edl");
+    }
+
+    EXPECT_EQ(CutCommands::generate(m_model),
+              L"Events that can't be matched, since a timecode would lie outside of the day: 1\n"
+              L"The first is event 7, A009 (reel3.edl).");
+    EXPECT_EQ(m_model.changeEdl().size(), 1U);
+    EXPECT_EQ(m_undo.entries, Names{L"Generate Change EDL"});
+}
+
+TEST_F(CutCommandsTest, TellAlsoWhenNothingElseIsLeft)
+{
+    for (core::EventList* const cut : {&m_model.oldEdl(), &m_model.newEdl()})
+        cut->add(makeEvent("A009", "01:00:00:00", "01:01:40:12", "23:58:19:24", "23:59:59:24", 7));
+
+    EXPECT_EQ(CutCommands::generate(m_model),
+              L"Nothing of the old cut survives in the new one. See that both are of one reel.\n"
+              L"Events that can't be matched, since a timecode would lie outside of the day: 1\n"
+              L"The first is event 7, A009.");
+}
+
 TEST_F(CutCommandsTest, CountTheEventsOfAList)
 {
     add(m_model.oldEdl(), "A001");

@@ -83,5 +83,42 @@ TEST_F(KeepQuestionTest, TellsThatTheReelsDiffer)
     EXPECT_NE(questionOf(run).text().find(L"The cuts have different reels."), std::wstring::npos);
 }
 
+TEST_F(KeepQuestionTest, TellsWhatFindsNoRoom)
+{
+    // The black between the two shots has gone, and what stands in it.
+    const auto addShots = [](core::EventList& list, const char* dstIn, const char* dstOut) {
+        list.add(makeEvent("A001", "10:00:00:00", "10:00:10:00", "01:00:00:00", "01:00:10:00"));
+        list.add(makeEvent("B002", "12:00:00:00", "12:00:10:00", dstIn, dstOut));
+    };
+    addShots(m_model.oldEdl(), "01:00:20:00", "01:00:30:00");
+    addShots(m_model.newEdl(), "01:00:10:00", "01:00:20:00");
+    ASSERT_EQ(m_model.generateChangeEdl(), util::Result::Ok);
+    const ProtectedRun run = runWith({{Hour - 2, Hour - 1}, {Hour + 12, Hour + 15}});
+    const KeepQuestion question = questionOf(run);
+
+    EXPECT_TRUE(question.canKeep());
+    EXPECT_NE(question.text().find(L"00:00:03:00 finds no room in the new cut and goes in any case."),
+              std::wstring::npos);
+}
+
+TEST_F(KeepQuestionTest, TellsWhatWouldLeaveTheDay)
+{
+    const auto addShot = [](core::EventList& list, const char* dstIn, const char* dstOut) {
+        list.add(makeEvent("A001", "10:00:00:00", "10:00:10:00", dstIn, dstOut));
+    };
+    addShot(m_model.oldEdl(), "23:59:40:00", "23:59:50:00");
+    addShot(m_model.newEdl(), "23:59:48:00", "23:59:58:00");
+    ASSERT_EQ(m_model.generateChangeEdl(), util::Result::Ok);
+    const double midnight = 24 * Hour;
+    // What follows the reel moves with it, by eight seconds. What stands hours before stays.
+    const ProtectedRun run = runWith({{12 * Hour, 12 * Hour + 1}, {midnight - 6, midnight - 4}});
+    const KeepQuestion question = questionOf(run);
+
+    EXPECT_TRUE(question.isNeeded());
+    EXPECT_FALSE(question.canKeep());
+    EXPECT_NE(question.text().find(L"It can't be kept: 00:00:02:00 would have to move out of the day."),
+              std::wstring::npos);
+}
+
 } // namespace
 } // namespace cadrel::tests

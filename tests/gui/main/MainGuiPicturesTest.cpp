@@ -78,6 +78,15 @@ TEST_F(MainGuiPicturesTest, ShowsASelectionAndAPreview)
     expectPicture(*m_gui, "main-preview");
 }
 
+TEST_F(MainGuiPicturesTest, ShowsTheFramesOfTheSelectedEvent)
+{
+    showReel();
+    select("Change", {4});
+    m_video->deliver();
+    table("Change").grabKeyboardFocus();
+    expectPicture(*m_gui, "main-selected");
+}
+
 TEST_F(MainGuiPicturesTest, IsDimmedDuringARun)
 {
     showReel();

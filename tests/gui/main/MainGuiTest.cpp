@@ -2,6 +2,8 @@
 
 #include "gui/main/MainGui.h"
 
+#include "core/protect/RunRecord.h"
+#include "core/serialize/ByteArchive.h"
 #include "gui/look/FlashTextButton.h"
 #include "gui/look/Text.h"
 #include "tests/gui/main/ShownWindow.h"
@@ -9,6 +11,7 @@
 #include "tests/support/window/CutTexts.h"
 #include "tests/support/window/GermanTexts.h"
 
+#include <functional>
 #include <optional>
 
 namespace cadrel::tests {
@@ -356,11 +359,9 @@ TEST_F(MainGuiTest, FollowsEachList)
     EXPECT_EQ(tableModel("Change").getNumRows(), 5);
 }
 
-TEST_F(MainGuiTest, IgnoresAListThatItDoesNotKnow)
+TEST_F(MainGuiTest, IgnoresAListWithoutAModel)
 {
     showThree();
-    notify(EventListChangeContext(3));
-    notify(EventListChangeContext(-1));
     deactivate();
     notify(EventListChangeContext(ListKind::Old));
 
@@ -1070,6 +1071,63 @@ TEST_F(MainGuiTest, MarksVfxShotsAtOnceWhenTheSettingsClose)
     EXPECT_TRUE(list(ListKind::Old).at(0).vfx());
 }
 
+TEST_F(MainGuiTest, TellsOnceOfAVfxNameThatCannotBeUsedInWhateverWayTheSettingsClose)
+{
+    const Texts once{L"A VFX name of the settings can't be used. Correct it there."};
+    fill(ListKind::Old, 1);
+    activate();
+    m_model.settings().setVfxPattern({"A00", "", true}, 0);
+    m_model.settings().setVfxPattern({"(", "", true}, 1);
+    const std::vector<std::function<void()>> ways{[this] { m_window.press(juce::KeyPress::escapeKey); },
+                                                  [this] { m_window.press(juce::KeyPress::returnKey); },
+                                                  [this] { m_window.click(juce::Point<int>(1200, 300)); }};
+    for (const auto& close : ways) {
+        m_alerts.messages.clear();
+        click("Settings Button");
+        close();
+
+        EXPECT_FALSE(settingsDialog().isVisible());
+        EXPECT_EQ(m_alerts.messages, once);
+    }
+    EXPECT_FALSE(list(ListKind::Old).at(0).vfx()) << "no name counts until all can be used";
+}
+
+TEST_F(MainGuiTest, SaysNothingOfAVfxNameWhenTheProjectComesOrGoes)
+{
+    fill(ListKind::Old, 1);
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    activate();
+    for (const char* const open : {"Settings Button", "Load Old Edl Button"}) {
+        click(open);
+        deactivate();
+        activate();
+        click(open);
+        DataModel other;
+        notify(core::DataModelChangeContext(&other));
+        activate();
+    }
+    click("Settings Button");
+    m_gui.reset();
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+}
+
+TEST_F(MainGuiTest, TellsOfAVfxNameAfterAnUndoOnlyWhenTheSettingsClose)
+{
+    fill(ListKind::Old, 1);
+    activate();
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    core::serialize::ByteArchive before;
+    before << m_model;
+    click("Settings Button");
+    m_model.restore(before);
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+    ASSERT_TRUE(settingsDialog().isVisible());
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_EQ(m_alerts.messages.size(), 1U);
+}
+
 TEST_F(MainGuiTest, ShowsSettingsThatChangeElsewhere)
 {
     activate();
@@ -1191,6 +1249,34 @@ protected:
         m_engine.material = {{3600, 3615}, {5 * 3600, 5 * 3600 + 60}};
         activate();
     }
+    /// Two shots, of which the first has lost its last two seconds, and a second of sound before them:
+    ///
+    ///     old    |-- A --|-- B --|       10 s each, from 01:00:00:00
+    ///     new    |- A -|-- B --|
+    void showGenerated()
+    {
+        const auto addShots = [](core::EventList& cut, const char* endOfA, const char* between, const char* end) {
+            cut.add(makeEvent("A001", "10:00:00:00", endOfA, "01:00:00:00", between));
+            cut.add(makeEvent("B002", "12:00:00:00", "12:00:10:00", between, end));
+        };
+        addShots(list(ListKind::Old), "10:00:10:00", "01:00:10:00", "01:00:20:00");
+        addShots(list(ListKind::New), "10:00:08:00", "01:00:08:00", "01:00:18:00");
+        ASSERT_EQ(m_model.generateChangeEdl(), Result::Ok);
+        ASSERT_EQ(list(ListKind::Change).size(), 2U);
+        m_engine.material = {{3598, 3599}};
+        activate();
+    }
+    /// A shot that comes to stand eight seconds later, close to midnight, and sound hours before.
+    void showLateReel()
+    {
+        list(ListKind::Old).add(makeEvent("A001", "10:00:00:00", "10:00:10:00", "23:59:40:00", "23:59:50:00"));
+        list(ListKind::New).add(makeEvent("A001", "10:00:00:00", "10:00:10:00", "23:59:48:00", "23:59:58:00"));
+        ASSERT_EQ(m_model.generateChangeEdl(), Result::Ok);
+        m_engine.material = {{12 * 3600, 12 * 3600 + 1}};
+        activate();
+    }
+    /// Sound after the late reel, which would move with it, out of the day.
+    void addSoundAtMidnight() { m_engine.material.push_back({24 * 3600 - 6, 24 * 3600 - 4}); }
 };
 
 TEST_F(MainGuiProtectionTest, StartsARunThatTakesNothingAwayWithoutAQuestion)
@@ -1212,7 +1298,9 @@ TEST_F(MainGuiProtectionTest, KeepsWhatTheListDoesNotCarryUnlessTheUserWantsOthe
     EXPECT_EQ(m_alerts.messages[0].substr(0, 11), L"00:01:00:00");
     EXPECT_EQ(m_alerts.buttons[0], (Texts{L"Keep", L"Don't Keep", L"Cancel"}));
     EXPECT_EQ(m_engine.calls, Calls{"run 3600..3625"});
-    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
+    // The list stays as it is, so that there is nothing to undo.
+    EXPECT_EQ(m_undo.begun, Texts());
+    EXPECT_EQ(list(ListKind::Change).size(), 1U);
     EXPECT_FALSE(m_gui->isEnabled());
 }
 
@@ -1234,6 +1322,7 @@ TEST_F(MainGuiProtectionTest, StartsNoRunWhenTheUserCancelsOrClosesTheQuestion)
         click("Cadrel Button");
     }
 
+    EXPECT_EQ(m_alerts.messages.size(), 3U);
     EXPECT_EQ(m_engine.calls, Calls());
     EXPECT_EQ(m_undo.begun, Texts());
     EXPECT_TRUE(m_gui->isEnabled());
@@ -1251,7 +1340,91 @@ TEST_F(MainGuiProtectionTest, StartsNoRunWhenTheProjectGoesDuringTheQuestion)
     m_engine.ready = Result::Ok;
     click("Cadrel Button");
 
+    EXPECT_EQ(m_alerts.messages.size(), 3U);
     EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiProtectionTest, PutsAListThatKeepsAllInThePlaceOfAGeneratedOne)
+{
+    showGenerated();
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_engine.calls, Calls{"run 3608..3620"});
+    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
+    ASSERT_EQ(list(ListKind::Change).size(), 1U);
+    EXPECT_EQ(list(ListKind::Change).at(0).rollName(), "B002");
+}
+
+TEST_F(MainGuiProtectionTest, LeavesAGeneratedListAsItIsWhenTheRunIsRefused)
+{
+    showGenerated();
+    m_engine.answer = Result::HostCallFailed;
+    click("Cadrel Button");
+
+    EXPECT_EQ(list(ListKind::Change).size(), 2U);
+    EXPECT_EQ(m_undo.begun, Texts());
+    EXPECT_EQ(m_alerts.messages.back(), L"The workstation has refused this. Check that no track is locked.");
+    EXPECT_TRUE(m_gui->isEnabled());
+}
+
+TEST_F(MainGuiProtectionTest, DropsTheRunWhoseListCannotBeMade)
+{
+    showGenerated();
+    m_undo.failure = Result::HostCallFailed;
+    click("Cadrel Button");
+
+    EXPECT_EQ(list(ListKind::Change).size(), 2U);
+    EXPECT_EQ(m_engine.calls, (Calls{"run 3608..3620", "off"}));
+    EXPECT_EQ(m_alerts.messages.back(), L"The workstation has refused this. Check that no track is locked.");
+    EXPECT_TRUE(m_gui->isEnabled());
+}
+
+TEST_F(MainGuiProtectionTest, AsksAgainWhenThereIsMoreToKeepAfterTheQuestion)
+{
+    showGivenList();
+    m_alerts.meanwhile = [this] { m_engine.material.push_back({6 * 3600, 6 * 3600 + 30}); };
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 2U);
+    EXPECT_EQ(m_alerts.messages[0].substr(0, 11), L"00:01:00:00");
+    EXPECT_EQ(m_alerts.messages[1].substr(0, 11), L"00:01:30:00");
+    EXPECT_EQ(m_engine.calls, Calls{"run 3600..3625"});
+}
+
+TEST_F(MainGuiProtectionTest, StartsAPlainRunWhenThereIsNothingLeftToKeepAfterTheQuestion)
+{
+    showGivenList();
+    m_alerts.meanwhile = [this] { m_engine.material.pop_back(); };
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+}
+
+TEST_F(MainGuiProtectionTest, AsksAgainWhenNothingCanBeKeptAfterTheQuestion)
+{
+    showLateReel();
+    m_alerts.meanwhile = [this] { addSoundAtMidnight(); };
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 2U);
+    EXPECT_NE(m_alerts.messages[1].find(L"It can't be kept"), std::wstring::npos);
+    // The first button of the second question is the one that changes nothing.
+    EXPECT_EQ(m_alerts.buttons[1], (Texts{L"Cancel", L"Don't Keep"}));
+    EXPECT_EQ(m_engine.calls, Calls());
+    EXPECT_EQ(list(ListKind::Change).size(), 1U);
+}
+
+TEST_F(MainGuiProtectionTest, OffersToLeaveItWhereNothingCanBeKept)
+{
+    showLateReel();
+    addSoundAtMidnight();
+    m_alerts.answer = 2;
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_alerts.buttons.at(0), (Texts{L"Cancel", L"Don't Keep"}));
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
 }
 
 TEST_F(MainGuiProtectionTest, StartsNoRunWhenItCannotLookAtTheProject)
@@ -1278,6 +1451,83 @@ TEST_F(MainGuiProtectionTest, TellsThatNothingHasToChange)
     click("Cadrel Button");
 
     EXPECT_EQ(m_alerts.messages.back(), L"Everything stands where the new cut has it. Nothing has to change.");
+    EXPECT_EQ(m_engine.calls, Calls());
+    // It counts as done, so that the next one can go on from there.
+    EXPECT_EQ(m_undo.entries, Texts{L"Apply Cadrel"});
+    const auto noted = core::RunRecord::find(m_model);
+    ASSERT_TRUE(noted);
+    EXPECT_EQ(noted->firstDifference(list(ListKind::New)), std::nullopt);
+}
+
+// ---- A run that has been done --------------------------------------------------------------------------------------
+
+class MainGuiRepeatTest : public ShownWindow {
+protected:
+    MainGuiRepeatTest()
+    {
+        list(ListKind::Change).add(makeEvent("A001", "01:00:00:00", "01:00:15:00", "01:00:10:00", "01:00:25:00", 1));
+        m_engine.material = {{3600, 3615}};
+        activate();
+        core::RunRecord::addRun(m_model, core::PastRuns::AllTime);
+    }
+};
+
+TEST_F(MainGuiRepeatTest, StartsTheSameRunAgainOnlyWhenTheUserWantsThat)
+{
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_alerts.messages[0].substr(0, 61), L"This Change EDL has been carried out in the project already.\n");
+    EXPECT_EQ(m_alerts.buttons[0], (Texts{L"Cancel", L"Start Anyway"}));
+    EXPECT_EQ(m_engine.calls, Calls());
+    EXPECT_TRUE(m_gui->isEnabled());
+    m_alerts.answer = 2;
+    click("Cadrel Button");
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+}
+
+TEST_F(MainGuiRepeatTest, StartsNoRunWhenTheUserClosesTheQuestion)
+{
+    for (const std::int32_t answer : {0, 3}) {
+        m_alerts.answer = answer;
+        click("Cadrel Button");
+    }
+
+    EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiRepeatTest, AsksThenAlsoWhatIsToBeKept)
+{
+    m_engine.material.push_back({5 * 3600, 5 * 3600 + 60});
+    m_alerts.answer = 2;
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.buttons.size(), 2U);
+    EXPECT_EQ(m_alerts.buttons[1], (Texts{L"Keep", L"Don't Keep", L"Cancel"}));
+    EXPECT_EQ(m_engine.calls, Calls{"run"});
+}
+
+TEST_F(MainGuiRepeatTest, AsksNothingWhereNoRunCanBeReadFromTheProject)
+{
+    for (const char* const note : {"", "no bytes of runs"}) {
+        m_model.setProperty(PropertyKey::DoneRuns, core::Variant(note));
+        click("Cadrel Button");
+        notify(ActionChangeContext(ActionChangeContext::Run, Result::Ok));
+    }
+
+    EXPECT_EQ(m_alerts.messages, Texts());
+    EXPECT_EQ(m_engine.calls, (Calls{"run", "run"}));
+}
+
+TEST_F(MainGuiRepeatTest, StartsNoRunWhenTheProjectGoesDuringTheQuestion)
+{
+    m_alerts.answer = 2;
+    m_alerts.meanwhile = [this] { deactivate(); };
+    click("Cadrel Button");
+    activate();
+    m_alerts.meanwhile = [this] { m_gui.reset(); };
+    click("Cadrel Button");
+
     EXPECT_EQ(m_engine.calls, Calls());
 }
 

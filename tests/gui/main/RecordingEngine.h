@@ -28,6 +28,8 @@ public:
     std::vector<std::string> calls;
     TestPool pool;
     std::vector<core::SecondsRange> material;
+    double origin = 0.0;
+    bool hasName = true;             ///< the host can tell the file of the project
     std::function<void()> onPreview; ///< called once, when the preview is switched
 
     util::Result::Type canStart() override { return ready; }
@@ -53,7 +55,13 @@ public:
         return note("cycle " + textOf(events, first, last, options));
     }
     util::Result::Type endPreview() override { return note("end"); }
-    std::wstring getProjectName() override { return L"/films/film.stage"; }
+    std::wstring getProjectName() override
+    {
+        if (!hasName)
+            throw util::Result::HostCallFailed;
+        return L"/films/film.stage";
+    }
+    double getTimeOrigin() override { return origin; }
     core::MediaPoolInterface* getMediaPool() override { return &pool; }
     void setPreviewActive(bool active) override
     {

@@ -649,8 +649,12 @@ TEST_F(SettingsDialogTest, CoversTheTimesWhileTheRangeIsNotRestricted)
     open();
     EXPECT_FALSE(before().isEnabled());
     EXPECT_FALSE(after().isEnabled());
+    for (const char* const label : {"Preserve Before Label", "Preserve After Label"})
+        EXPECT_FALSE(named<juce::Label>(label).isEnabled());
 
     m_window.click(toggle("Preserve Select"));
+    for (const char* const label : {"Preserve Before Label", "Preserve After Label"})
+        EXPECT_TRUE(named<juce::Label>(label).isEnabled());
     EXPECT_TRUE(before().isEnabled());
     EXPECT_TRUE(after().isEnabled());
     enter(before(), "00:00:10:00");

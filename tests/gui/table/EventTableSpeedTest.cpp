@@ -21,8 +21,6 @@ using cadrel::tests::secondsOf;
 namespace {
 
 constexpr int EventCount = 100000;
-/// The limit in seconds of what asks for each of them in the other lists.
-constexpr double ManyAtOnce = 0.25;
 
 /// A list that no one has by hand: 100,000 events of a few frames.
 class EventTableSpeedTest : public cadrel::tests::ShownTable {
@@ -46,13 +44,13 @@ protected:
     }
 
     /// The best of some runs counts, as the machine has other work.
-    static void expectFast(const char* step, const std::function<void()>& action, double limit = 0.1)
+    static void expectFast(const char* step, const std::function<void()>& action)
     {
         double best = 1e9;
         for (int run = 0; run < 5; ++run)
             best = std::min(best, secondsOf(action));
         std::cout << step << ": " << best * 1000.0 << " ms\n";
-        EXPECT_LT(best, CADREL_ADDRESS_SANITIZER ? 20.0 * limit : limit) << step;
+        EXPECT_LT(best, CADREL_ADDRESS_SANITIZER ? 2.0 : 0.1) << step;
     }
 
     void paintTable() { m_table.createComponentSnapshot(m_table.getLocalBounds(), true, 1.0F); }
@@ -102,12 +100,10 @@ TEST_F(EventTableSpeedTest, EachStepOfAHundredThousandRowsIsDoneInATenthOfASecon
                [&] { EXPECT_EQ(m_dataModel.oldEventsBehind({list().eventAt(5000)}).size(), 1U); });
     expectFast("related new events of one",
                [&] { EXPECT_EQ(m_dataModel.newEventsBehind({list().eventAt(5000)}).size(), 1U); });
-    expectFast(
-        "related old events of all", [&] { EXPECT_EQ(m_dataModel.oldEventsBehind(list().events()).size(), 100000U); },
-        ManyAtOnce);
-    expectFast(
-        "related new events of all", [&] { EXPECT_EQ(m_dataModel.newEventsBehind(list().events()).size(), 100000U); },
-        ManyAtOnce);
+    expectFast("related old events of all",
+               [&] { EXPECT_EQ(m_dataModel.oldEventsBehind(list().events()).size(), 100000U); });
+    expectFast("related new events of all",
+               [&] { EXPECT_EQ(m_dataModel.newEventsBehind(list().events()).size(), 100000U); });
     expectFast("open the menu of one", [&] {
         m_model->selectRows(RowSet::parse("5000", EventCount));
         m_model->openMenu();

@@ -7,6 +7,8 @@
 #include "gui/input/TcInput.h"
 #include "gui/look/LookAndFeel.h"
 #include "gui/video/VideoListTableModel.h"
+#include "tests/support/Sanitizer.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/core/RecordingUndo.h"
 #include "tests/support/core/TestPool.h"
 #include "tests/support/core/TestProject.h"
@@ -19,7 +21,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <functional>
+#include <iostream>
 #include <memory>
 #include <stdexcept>
 #include <string>
@@ -805,6 +809,40 @@ TEST_F(NewVideosDialogTest, TheRowThatGetsTheKeyboardComesIntoView)
     EXPECT_GT(table().getViewport()->getViewPositionY(), 0);
 }
 
+TEST_F(NewVideosDialogTest, TellsByAWordWhichVideoIsMissingAndRemovesItByAClick)
+{
+    m_list.add(Entry("/gone/reel9_v11.mov", Timecode("05:00:00:00"), Timecode("00:01:00:00")), false);
+    open();
+    ASSERT_EQ(shown().back(), "*Missing: reel9_v11.mov 05:00:00:00");
+    EXPECT_EQ(use(3).getTitle(), "Use as New Video, Missing: reel9_v11.mov");
+
+    m_window.click(use(3));
+
+    EXPECT_TRUE(m_list.isEmpty());
+    EXPECT_EQ(shown(), AllUnused);
+    EXPECT_EQ(m_undo.entries, Messages{L"Remove New Video"});
+}
+
+TEST_F(NewVideosDialogTest, KeepsASelectionOfManyVideosInAShortTime)
+{
+    m_pool.videos.clear();
+    for (int number = 0; number < 10000; ++number)
+        m_pool.videos.push_back({L"/picture/reel " + std::to_wstring(number) + L" v12.mov", Minute});
+    open();
+    juce::SparseSet<int> every;
+    every.addRange({0, 10000});
+    for (int row = 1; row < 10000; row += 2)
+        every.removeRange({row, row + 1});
+    table().setSelectedRows(every);
+    double best = 1e9;
+    for (int run = 0; run < 5; ++run)
+        best = std::min(best, secondsOf([this] { m_dialog->refresh(&m_pool); }));
+    std::cout << "refresh with every other row selected: " << best * 1000.0 << " ms\n";
+
+    EXPECT_EQ(table().getNumSelectedRows(), 5000);
+    EXPECT_LT(best, CADREL_ADDRESS_SANITIZER ? 2.0 : 0.1);
+}
+
 TEST_F(NewVideosDialogTest, TellsScreenReadersWhatItsCellsAre)
 {
     open();
@@ -873,6 +911,15 @@ TEST_F(NewVideosDialogTest, LooksAsItDoesWithLongNamesAndOneTrack)
     start(1).grabKeyboardFocus();
 
     expectPicture(*m_dialog, "new-videos-long-names");
+}
+
+TEST_F(NewVideosDialogTest, LooksAsItDoesWithAVideoThatIsMissing)
+{
+    m_list.add(Entry("/gone/reel2_v11.mov", Timecode("01:01:00:00"), Timecode("00:02:00:00")), false);
+    m_list.add(Entry("/picture/reel1_v12.mov", Timecode("01:00:00:00"), Timecode("00:01:00:00")), false);
+    open();
+
+    expectPicture(*m_dialog, "new-videos-missing");
 }
 
 TEST_F(NewVideosDialogTest, LooksAsItDoesWhenItIsDisabled)

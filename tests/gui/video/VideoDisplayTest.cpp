@@ -293,15 +293,48 @@ TEST_F(VideoDisplayTest, AsksForAPixelWhereThereIsNoRoom)
     EXPECT_EQ(m_video->request(Old).height, 1);
 }
 
-TEST_F(VideoDisplayTest, TellsItsCallerWhatTheProviderRefuses)
+TEST_F(VideoDisplayTest, ShowsPlaceholdersWhereTheProviderRefusesAPicture)
 {
     m_display->setProvider(m_video);
+    showFrames("01:00:10:00", "01:00:08:12", false);
+    m_video->deliver();
     m_video->failure = util::Result::HostCallFailed;
+    showFrames("01:00:20:00", "01:00:18:12", false);
 
-    EXPECT_EQ(thrownBy([&] { showFrames("01:00:10:00", "01:00:08:12", false); }), util::Result::HostCallFailed);
-    EXPECT_EQ(times(), "01:00:10:00 01:00:08:12");
+    EXPECT_EQ(times(), "01:00:20:00 01:00:18:12");
+    EXPECT_TRUE(showsPlaceholders());
     m_display->setSize(204, 349);
     EXPECT_TRUE(m_alerts.messages.empty());
+}
+
+/// Has no pictures of the old version.
+class NewVideoAlone : public TestVideo {
+protected:
+    void requestImage(std::size_t side, int width, int height, bool lastFrame, double time) override
+    {
+        if (side == OldSide)
+            throw util::Result::HostCallFailed;
+        TestVideo::requestImage(side, width, height, lastFrame, time);
+    }
+};
+
+TEST_F(VideoDisplayTest, AsksForTheNewPictureAlsoWhenTheOldOneIsRefused)
+{
+    const auto video = std::make_shared<NewVideoAlone>();
+    thrownBy([&] { m_display->setProvider(video); });
+    showFrames("01:00:10:00", "01:00:08:12", false);
+
+    EXPECT_EQ(video->request(New).time, 3608.48);
+}
+
+TEST_F(VideoDisplayTest, SaysOnceWhatEachPartIs)
+{
+    EXPECT_EQ(named("old time").getDescription(), "The picture of the old edit version");
+    EXPECT_EQ(named("new time").getDescription(), "The picture of the new edit version");
+    int readers = 0;
+    for (const juce::Component* const component : m_display->getChildren())
+        readers += component->isAccessible() && component->getTitle() == "The picture of the old edit version" ? 1 : 0;
+    EXPECT_EQ(readers, 1);
 }
 
 TEST_F(VideoDisplayTest, TellsThatTheBlockResultHoldsTheOldPicture)

@@ -3,17 +3,22 @@
 #include "gui/video/VideoRows.h"
 
 #include "core/model/VideoList.h"
+#include "core/serialize/ByteArchive.h"
+#include "tests/support/Sanitizer.h"
+#include "tests/support/SecondsOf.h"
 #include "tests/support/ThrownResult.h"
 #include "tests/support/core/RecordingUndo.h"
 #include "tests/support/core/TestPool.h"
 #include "tests/support/core/TestProject.h"
 #include "util/Result.h"
+#include "util/StringUtil.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
 #include <algorithm>
 #include <cmath>
+#include <iostream>
 #include <limits>
 #include <string>
 #include <utility>
@@ -373,6 +378,112 @@ TEST_F(VideoRowsTest, HasFiveColumns)
                                                                              {3, L"Start", 100, 100},
                                                                              {4, L"End", 100, 100},
                                                                              {5, L"Length", 100, 100}}));
+}
+
+// ---- Videos of the list that have left the pool --------------------------------------------------------------------
+
+TEST_F(VideoRowsTest, AVideoThatIsNotInThePoolAnyMoreIsShownAsMissing)
+{
+    m_list.add(Entry("/gone/reel0.mov", Timecode("05:00:00:00"), Timecode("00:01:00:00")), false);
+    m_list.add(Entry("/a/reel1.mov", Timecode("02:00:00:00"), Timecode("00:01:00:00")), false);
+    m_rows.refill();
+
+    EXPECT_EQ(shown(),
+              (Rows{"*reel0.mov 05:00:00:00 05:01:00:00 00:01:00:00", "*reel1.mov 02:00:00:00 02:01:00:00 00:01:00:00",
+                    "reel2.mov 05:01:00:00 05:03:00:00 00:02:00:00", "reel3.mov 05:01:00:00 05:04:00:00 00:03:00:00"}));
+    EXPECT_EQ(m_rows.text(0, VideoColumn::Name), L"Missing: reel0.mov");
+    EXPECT_EQ(m_rows.text(1, VideoColumn::Name), L"reel1.mov");
+    EXPECT_TRUE(m_rows.at(0).isMissing);
+    EXPECT_FALSE(m_rows.at(1).isMissing);
+    EXPECT_FALSE(m_rows.at(2).isMissing);
+}
+
+TEST_F(VideoRowsTest, AVideoThatComesBackIntoThePoolIsMissingNoLonger)
+{
+    m_list.add(Entry("/gone/reel0.mov", Timecode("05:00:00:00"), Timecode("00:01:00:00")), false);
+    m_pool.videos.push_back({L"/elsewhere/reel0.mov", Minute});
+    m_rows.refill();
+
+    EXPECT_FALSE(m_rows.at(*m_rows.find("/elsewhere/reel0.mov")).isMissing);
+    EXPECT_EQ(m_rows.count(), 4U);
+}
+
+TEST_F(VideoRowsTest, RemovesAMissingVideoAsOneUndoEntry)
+{
+    m_list.add(Entry("/gone/reel0.mov", Timecode("05:00:00:00"), Timecode("00:01:00:00")), false);
+    m_rows.refill();
+    use("/gone/reel0.mov", false);
+
+    EXPECT_TRUE(m_list.isEmpty());
+    EXPECT_EQ(m_undo.entries, Names{L"Remove New Video"});
+    EXPECT_EQ(m_rows.count(), 3U);
+    EXPECT_EQ(m_rows.find("/gone/reel0.mov"), std::nullopt);
+}
+
+TEST_F(VideoRowsTest, MovesAMissingVideo)
+{
+    m_list.add(Entry("/gone/reel0.mov", Timecode("05:00:00:00"), Timecode("00:01:00:00")), false);
+    m_rows.refill();
+    start("/gone/reel0.mov", "06:00:00:00");
+
+    EXPECT_EQ(startOf("/gone/reel0.mov"), "06:00:00:00");
+    EXPECT_EQ(m_undo.entries, Names{L"Move New Video"});
+}
+
+TEST_F(VideoRowsTest, EachOfSeveralMissingVideosCanBeRemovedWhateverItsPathIs)
+{
+    // As no one can add them, but a stored list may hold them.
+    const std::vector<std::string> stored{
+        "/gone/reel0.mov", "/gone/reel0.mov", "/lost/reel0.mov", "", "\xff\xfe", "/x/"};
+    core::serialize::ByteArchive archive;
+    archive.writeCount(stored.size());
+    for (std::size_t index = 0; index < stored.size(); ++index)
+        archive << Entry(stored[index], Timecode(5, 0, 0, static_cast<std::int32_t>(index)), Timecode("00:01:00:00"));
+    m_list.readCurrent(archive);
+    m_rows.refill();
+    EXPECT_EQ(m_rows.count(), 3U + 5U) << "one row for those with the same path";
+
+    for (std::size_t left = stored.size(); left > 0; --left) {
+        ASSERT_EQ(m_list.size(), left);
+        std::size_t row = 0;
+        while (!m_rows.at(row).isMissing)
+            ++row;
+        EXPECT_EQ(m_rows.text(row, VideoColumn::Name).substr(0, 9), L"Missing: ");
+        m_rows.setUsed(std::string(m_rows.at(row).path), false);
+        m_rows.refill();
+    }
+    EXPECT_TRUE(m_list.isEmpty());
+    EXPECT_EQ(m_rows.count(), 3U);
+}
+
+TEST_F(VideoRowsTest, NothingIsMissingWithoutAPoolOrAProject)
+{
+    m_list.add(Entry("/gone/reel0.mov", Timecode("05:00:00:00"), Timecode("00:01:00:00")), false);
+    m_rows.setMediaPool(nullptr);
+    m_rows.refill();
+    EXPECT_EQ(m_rows.count(), 0U);
+
+    m_rows.setMediaPool(&m_pool);
+    const NoProject none;
+    m_rows.refill();
+    EXPECT_EQ(m_rows.count(), 0U);
+}
+
+TEST_F(VideoRowsTest, TenThousandVideosAreReadInATenthOfASecond)
+{
+    m_pool.videos.clear();
+    for (int number = 0; number < 10000; ++number) {
+        const std::wstring path = L"/picture/2026-11-22 reel " + std::to_wstring(number) + L" v12.mov";
+        m_pool.videos.push_back({path, Minute});
+        if (number % 10 == 0)
+            m_list.add(Entry(util::StringUtil::toUtf8(path), Timecode(number * 100), Timecode("00:00:04:00")), false);
+    }
+    double best = 1e9;
+    for (int run = 0; run < 5; ++run)
+        best = std::min(best, secondsOf([this] { m_rows.refill(); }));
+    std::cout << "refill: " << best * 1000.0 << " ms\n";
+    ASSERT_EQ(m_rows.count(), 10000U);
+    EXPECT_LT(best, CADREL_ADDRESS_SANITIZER ? 2.0 : 0.1);
 }
 
 RC_GTEST_FIXTURE_PROP(VideoRowsTest, NoTwoVideosThatAreUsedStartTogetherWhateverTheUserDoes, ())

@@ -107,6 +107,46 @@ TEST_F(PreviewRecordTest, ReachesToTheLastPointOfItsAutomation)
     EXPECT_EQ(kept()->end(), 140.0);
 }
 
+TEST_F(PreviewRecordTest, KnowsTheCurvesOnWhichSomethingWasWritten)
+{
+    using Curve = standin::Envelope::Curve;
+    host.addPoint(node, Curve::Volume, 100.0, 0.5F);
+    host.addPoint(node, Curve::Pan, 99.0, 0.5F);
+    keep(record());
+    host.addPoint(node, Curve::Mute, 105.0, 0.5F);
+
+    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Volume));
+    EXPECT_FALSE(kept()->hasWrittenOn(Curve::Pan));
+    EXPECT_FALSE(kept()->hasWrittenOn(Curve::Mute));
+}
+
+TEST_F(PreviewRecordTest, MayHaveWrittenOnEachCurveWhereThatIsNotKnown)
+{
+    using Curve = standin::Envelope::Curve;
+    host.addPoint(node, Curve::Volume, 100.0, 0.5F);
+    keep(record());
+    const Numbers whole = stored(AttributeKey::PreviewCurves);
+    ASSERT_EQ(whole.size(), 2U);
+    ASSERT_FALSE(kept()->hasWrittenOn(Curve::Pan));
+
+    for (std::size_t index = 0; index < whole.size(); ++index) {
+        Numbers damaged = whole;
+        damaged[index] += 1.0;
+        store(AttributeKey::PreviewCurves, damaged);
+        ASSERT_TRUE(kept());
+        EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan)) << index;
+    }
+    store(AttributeKey::PreviewCurves, {whole[0]});
+    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan));
+    removeNumbers(*node, AttributeKey::PreviewCurves);
+    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan));
+    // A copy of it without them doesn't know them either.
+    const PreviewRecord without = *kept();
+    store(AttributeKey::PreviewCurves, whole);
+    keep(without);
+    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan));
+}
+
 TEST_F(PreviewRecordTest, KeepsTheFrameRate)
 {
     const std::vector<core::Framerate> framerates{core::Framerate(25, 0), core::Framerate(30, true, 1),

@@ -280,6 +280,83 @@ TEST_P(AutomationCurveTest, AReversedGapIsLeftAlone)
     EXPECT_EQ(host.points(Volume), (Points{{10.0, 0.25F}, {20.0, 0.75F}}));
 }
 
+TEST_P(AutomationCurveTest, PointsOfTheUsersAtTheBoundsOfAHeldStretchStayWhatTheyAre)
+{
+    host.set(Volume, {{10.0, 0.5F}, {15.0, 1.0F}, {20.0, 0.75F}});
+    const auto before = standin::tests::childrenOf(*host.curveOf(host.node, Volume));
+    const auto expectKept = [&] {
+        const auto after = standin::tests::childrenOf(*host.curveOf(host.node, Volume));
+        ASSERT_GE(after.size(), 2U);
+        EXPECT_EQ(after.front(), before.front());
+        EXPECT_EQ(after.back(), before.back());
+    };
+
+    host.hold(10.0, 20.0);
+    expectKept();
+    EXPECT_EQ(host.points(Volume), (Points{{10.0, 0.5F}, {20.0, 0.5F}, {20.0, 0.75F}}));
+    ASSERT_TRUE(host.undo());
+    host.holdBackwards(10.0, 20.0);
+    expectKept();
+    EXPECT_EQ(host.points(Volume), (Points{{10.0, 0.5F}, {10.0, 0.75F}, {20.0, 0.75F}}));
+}
+
+TEST_P(AutomationCurveTest, WhatIsHeldGoesWhereTheCurveRunsTheSameWithoutIt)
+{
+    host.set(Volume, {{0.0, 0.5F}, {11.0, 0.5F}, {11.0, 1.0F}, {19.0, 1.0F}, {19.0, 0.5F}, {40.0, 0.5F}});
+    host.hold(10.0, 20.0);
+    ASSERT_EQ(host.points(Volume), (Points{{0.0, 0.5F}, {10.0, 0.5F}, {20.0, 0.5F}, {40.0, 0.5F}}));
+    const auto drop = [&](double start, double end) {
+        host.change(Volume,
+                    [&](AutomationCurve& curve) { curve.dropNeedless(*host.transaction(), clock(start), clock(end)); });
+    };
+
+    drop(21.0, 40.0);
+    EXPECT_EQ(host.points(Volume).size(), 4U) << "Those that go stand elsewhere.";
+    drop(20.0, 40.0);
+    EXPECT_EQ(host.points(Volume), (Points{{0.0, 0.5F}, {10.0, 0.5F}, {40.0, 0.5F}}));
+    drop(0.0, 40.0);
+    EXPECT_EQ(host.points(Volume), (Points{{0.0, 0.5F}, {40.0, 0.5F}}));
+    host.fill(10.0, 20.0);
+    drop(0.0, 40.0);
+    EXPECT_EQ(host.points(Volume).size(), 4U) << "What fills a gap stays.";
+}
+
+TEST_P(AutomationCurveTest, WhatIsHeldStaysWhereTheCurveNeedsIt)
+{
+    host.set(Volume, {{0.0, 0.0F}, {40.0, 1.0F}});
+    host.hold(10.0, 20.0);
+
+    host.change(Volume,
+                [&](AutomationCurve& curve) { curve.dropNeedless(*host.transaction(), clock(0.0), clock(40.0)); });
+
+    EXPECT_EQ(host.points(Volume), (Points{{0.0, 0.0F}, {10.0, 0.25F}, {20.0, 0.25F}, {20.0, 0.5F}, {40.0, 1.0F}}));
+}
+
+TEST_P(AutomationCurveTest, WhatTheUserHasSetStaysAlsoWhereTheCurveRunsTheSameWithoutIt)
+{
+    host.set(Volume, {{0.0, 0.5F}, {5.0, 0.5F}, {11.0, 0.5F}, {11.0, 1.0F}, {19.0, 1.0F}, {19.0, 0.5F}});
+    host.hold(10.0, 20.0);
+    ASSERT_EQ(host.points(Volume), (Points{{0.0, 0.5F}, {5.0, 0.5F}, {10.0, 0.5F}, {20.0, 0.5F}}));
+    const auto points = standin::tests::childrenOf(*host.curveOf(host.node, Volume));
+    const auto setAll = [&](float value) {
+        host.edit(u"Set", [&] {
+            for (const auto& point : points)
+                query<IAutomationPoint>(point)->setValue(value);
+        });
+    };
+    const auto drop = [&] {
+        host.change(Volume,
+                    [&](AutomationCurve& curve) { curve.dropNeedless(*host.transaction(), clock(0.0), clock(40.0)); });
+    };
+
+    setAll(0.75F);
+    drop();
+    EXPECT_EQ(host.points(Volume).size(), 4U) << "He has given them all another value.";
+    setAll(0.5F);
+    drop();
+    EXPECT_EQ(host.points(Volume), (Points{{0.0, 0.5F}, {5.0, 0.5F}}));
+}
+
 TEST_P(AutomationCurveTest, FilledGapsAreUndoneWithTheirTransaction)
 {
     host.set(Volume, {{0.0, 0.0F}, {15.0, 1.0F}, {30.0, 0.25F}});

@@ -41,6 +41,27 @@ TEST(DeleteRange, SplitsWhatHangsOverBothEdges)
     EXPECT_EQ(film.eventsOf(track), "part 0-5 (a 4-5 +0), part 15-20 (a 15-16 +11)");
 }
 
+//  |------- A -------|                  |---- A ----|
+//   |------ B ------|         becomes   |--- B ----|
+//         |--- C ---|                   |--- C ----|      in this order
+//  0     10         20                 10         20
+TEST(DeleteRange, WhatIsLeftOfThoseThatHungOverItsEndStaysBeforeWhatBeginsThere)
+{
+    RangeEditHost film;
+    const auto track = film.addTrack(TypeWord::Audio, u"DX 1");
+    film.addClip(track, u"C", 10, 20);
+    film.addClip(track, u"B", 1, 20);
+    film.addClip(track, u"A", 0, 20);
+
+    film.deleteRange(0, 10);
+    EXPECT_EQ(film.eventsOf(track), "A 10-20 +10, B 10-20 +9, C 10-20 +0");
+
+    ASSERT_TRUE(film.undo());
+    EXPECT_EQ(film.eventsOf(track), "A 0-20 +0, B 1-20 +0, C 10-20 +0");
+    ASSERT_TRUE(film.redo());
+    EXPECT_EQ(film.eventsOf(track), "A 10-20 +10, B 10-20 +9, C 10-20 +0");
+}
+
 TEST(DeleteRange, BothPiecesKeepTheAttributes)
 {
     RangeEditHost film;

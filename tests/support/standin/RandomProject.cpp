@@ -67,6 +67,8 @@ private:
             number += 1 + static_cast<int>(m_chance.below(3));
             const auto kind = m_chance.oneIn(4) ? MediaClip::Kind::Video : MediaClip::Kind::Audio;
             auto clip = makeCounted<MediaClip>(kind, u"/sound/" + name() + u".wav", time());
+            if (m_chance.oneIn(3))
+                clip->setFileRate(static_cast<double>(1 + m_chance.below(1000)));
             describe(*clip);
             m_project->pool().add(clip, number);
             m_clips.push_back(std::move(clip));

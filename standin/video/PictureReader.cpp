@@ -1,0 +1,289 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "standin/video/PictureReader.h"
+
+#include "standin/video/MediaOpening.h"
+#include "standin/video/VideoError.h"
+
+#include <algorithm>
+#include <limits>
+#include <vector>
+
+namespace standin {
+
+namespace fs = std::filesystem;
+
+using Reason = VideoError::Reason;
+
+namespace {
+
+constexpr std::int64_t NoTime = AV_NOPTS_VALUE;
+/// How far the search for a last picture goes back at first, in seconds.
+constexpr int FirstStep = 1;
+
+AvOwner<AVDictionary> decoderOptions()
+{
+    AVDictionary* options = nullptr;
+    av_dict_set_int(&options, "max_pixels", PictureReader::MostPixels, 0);
+    av_dict_set_int(&options, "threads", 1, 0);
+    return AvOwner<AVDictionary>(options);
+}
+
+/// Whether it is one of a film, and not the picture of an album.
+bool isFilm(const AVStream& stream)
+{
+    return stream.codecpar->codec_type == AVMEDIA_TYPE_VIDEO && (stream.disposition & AV_DISPOSITION_ATTACHED_PIC) == 0;
+}
+
+bool isPositive(AVRational ratio)
+{
+    return ratio.num > 0 && ratio.den > 0;
+}
+
+} // namespace
+
+PictureReader::PictureReader(const fs::path& file, Deadline deadline) : m_file(file), m_deadline(deadline)
+{
+    open();
+}
+
+void PictureReader::open()
+{
+    m_decoder.reset();
+    m_format.reset();
+    m_stream = nullptr;
+    restart();
+    m_waitsForKey = false;
+
+    m_format = openMedia(m_file, m_deadline);
+    refuseTooLarge();
+
+    // The libraries take an array of bare dictionaries, one for each stream that is known so far.
+    std::vector<AVDictionary*> perStream(m_format->nb_streams);
+    for (AVDictionary*& dictionary : perStream)
+        dictionary = decoderOptions().release();
+    const int found = avformat_find_stream_info(m_format.get(), perStream.empty() ? nullptr : perStream.data());
+    for (AVDictionary* dictionary : perStream)
+        av_dict_free(&dictionary);
+    if (found < 0)
+        throwFailure(m_deadline);
+    openDecoder();
+}
+
+void PictureReader::openDecoder()
+{
+    const int index = av_find_best_stream(m_format.get(), AVMEDIA_TYPE_VIDEO, -1, -1, nullptr, 0);
+    if (index < 0 || !isFilm(*m_format->streams[index]))
+        throw VideoError(Reason::NoPicture);
+    for (unsigned other = 0; other < m_format->nb_streams; ++other)
+        m_format->streams[other]->discard = static_cast<int>(other) == index ? AVDISCARD_DEFAULT : AVDISCARD_ALL;
+    m_stream = m_format->streams[index];
+    refuseTooLarge();
+    const AVCodecParameters& parameters = *m_stream->codecpar;
+    const AVCodec* const codec = avcodec_find_decoder(parameters.codec_id);
+    if (!codec || !isPositive(m_stream->time_base))
+        throw VideoError(Reason::Broken);
+    m_decoder = owned(avcodec_alloc_context3(codec));
+    if (avcodec_parameters_to_context(m_decoder.get(), &parameters) < 0)
+        throwFailure(m_deadline);
+    m_decoder->pkt_timebase = m_stream->time_base;
+    AVDictionary* options = decoderOptions().release();
+    const int error = avcodec_open2(m_decoder.get(), codec, &options);
+    av_dict_free(&options);
+    if (error < 0)
+        throwFailure(m_deadline);
+
+    const AVRational guessed = av_guess_frame_rate(m_format.get(), m_stream, nullptr);
+    const double rate = isPositive(guessed) ? std::clamp(av_q2d(guessed), 0.001, 1000.0) : 25.0;
+    m_rate = exactRate(rate);
+    m_frameTicks = std::max<std::int64_t>(
+        1, av_rescale_q(1, {static_cast<int>(m_rate.denominator), static_cast<int>(m_rate.numerator)},
+                        m_stream->time_base));
+}
+
+void PictureReader::refuseTooLarge() const
+{
+    for (unsigned index = 0; index < m_format->nb_streams; ++index) {
+        const AVCodecParameters& parameters = *m_format->streams[index]->codecpar;
+        if (isFilm(*m_format->streams[index]) && std::int64_t{parameters.width} * parameters.height > MostPixels)
+            throw VideoError(Reason::TooLarge);
+    }
+}
+
+bool PictureReader::next(AVFrame& picture)
+{
+    while (true) {
+        if (isLate())
+            throw VideoError(Reason::TooSlow);
+        av_frame_unref(&picture);
+        const int error = avcodec_receive_frame(m_decoder.get(), &picture);
+        if (error == AVERROR_EOF)
+            return false;
+        if (error == AVERROR(EAGAIN)) {
+            feed();
+            continue;
+        }
+        if (error < 0)
+            continue; // The decoder goes on with what comes after the damage.
+        if (timeOf(picture) == NoTime) {
+            if (!m_lastTime)
+                continue;
+            picture.best_effort_timestamp = *m_lastTime + m_frameTicks;
+        }
+        if (m_entry && timeOf(picture) < *m_entry)
+            continue;
+        m_lastTime = timeOf(picture);
+        return true;
+    }
+}
+
+void PictureReader::feed()
+{
+    if (m_isDrained || !readPacket()) {
+        m_isDrained = true;
+        avcodec_send_packet(m_decoder.get(), nullptr);
+        return;
+    }
+    decide(*m_packet);
+    // What can't be decoded is told by the picture that is missing then.
+    avcodec_send_packet(m_decoder.get(), m_packet.get());
+}
+
+/// Reads the next packet of the video. False at the end of the file, and where it can't be read any further.
+bool PictureReader::readPacket()
+{
+    while (true) {
+        av_packet_unref(m_packet.get());
+        const int error = av_read_frame(m_format.get(), m_packet.get());
+        if (isLate())
+            throw VideoError(Reason::TooSlow);
+        if (error < 0)
+            return false;
+        if (m_packet->stream_index != m_stream->index)
+            continue;
+        if (!m_waitsForKey)
+            return true;
+        if ((m_packet->flags & AV_PKT_FLAG_KEY) == 0)
+            continue;
+        m_waitsForKey = false;
+        if (m_packet->pts != NoTime)
+            m_entry = m_packet->pts;
+        return true;
+    }
+}
+
+/// Says whether the decoder leaves the packet out if no other depends on it.
+void PictureReader::decide(const AVPacket& packet)
+{
+    const bool canBeLeftOut = m_leaveOutBefore && packet.pts != NoTime && packet.pts < *m_leaveOutBefore;
+    m_decoder->skip_frame = canBeLeftOut ? AVDISCARD_NONREF : AVDISCARD_DEFAULT;
+    if (canBeLeftOut)
+        m_lastLeftOut = std::max(m_lastLeftOut.value_or(packet.pts), packet.pts);
+}
+
+bool PictureReader::seek(std::int64_t ticks)
+{
+    if (av_seek_frame(m_format.get(), m_stream->index, ticks, AVSEEK_FLAG_BACKWARD) < 0) {
+        if (isLate())
+            throw VideoError(Reason::TooSlow);
+        return false;
+    }
+    avcodec_flush_buffers(m_decoder.get());
+    restart();
+    m_waitsForKey = true;
+    return true;
+}
+
+void PictureReader::rewind()
+{
+    open();
+}
+
+void PictureReader::restart()
+{
+    m_isDrained = false;
+    m_entry.reset();
+    m_leaveOutBefore.reset();
+    m_lastLeftOut.reset();
+    m_lastTime.reset();
+}
+
+std::int64_t PictureReader::findEnd()
+{
+    const std::int64_t second = std::max<std::int64_t>(1, av_rescale_q(FirstStep, {1, 1}, m_stream->time_base));
+    const std::int64_t start = m_stream->start_time == NoTime ? 0 : m_stream->start_time;
+    const std::int64_t length = toldLength();
+    for (std::int64_t back = 0; back < length; back = back == 0 ? second : 2 * back) {
+        if (!seek(start + length - back))
+            break;
+        const Tail tail = readTail();
+        if (tail.hasUnknownTimes && seek(start + length - back))
+            return decodeTail();
+        if (tail.end)
+            return *tail.end;
+    }
+    rewind();
+    return decodeTail();
+}
+
+/// The length in ticks that the file claims to have; 0 when it tells none.
+std::int64_t PictureReader::toldLength() const
+{
+    if (m_stream->duration != NoTime)
+        return m_stream->duration;
+    if (m_format->duration != NoTime)
+        return av_rescale_q(m_format->duration, AVRational{1, AV_TIME_BASE}, m_stream->time_base);
+    return 0;
+}
+
+PictureReader::Tail PictureReader::readTail()
+{
+    Tail tail;
+    while (readPacket()) {
+        // A file that was cut short may end within a picture.
+        if ((m_packet->flags & (AV_PKT_FLAG_CORRUPT | AV_PKT_FLAG_DISCARD)) != 0)
+            continue;
+        if (m_packet->pts == NoTime) {
+            tail.hasUnknownTimes = true;
+            continue;
+        }
+        const std::int64_t end = m_packet->pts + (m_packet->duration > 0 ? m_packet->duration : m_frameTicks);
+        tail.end = std::max(tail.end.value_or(end), end);
+    }
+    return tail;
+}
+
+std::int64_t PictureReader::decodeTail()
+{
+    const auto picture = owned(av_frame_alloc());
+    std::optional<std::int64_t> end;
+    while (next(*picture))
+        end = timeOf(*picture) + durationOf(*picture);
+    if (!end)
+        throw VideoError(Reason::Broken);
+    return *end;
+}
+
+std::int64_t PictureReader::durationOf(const AVFrame& picture) const
+{
+    return picture.pkt_duration > 0 ? picture.pkt_duration : m_frameTicks;
+}
+
+Ratio PictureReader::timeBase() const
+{
+    return {m_stream->time_base.num, m_stream->time_base.den};
+}
+
+bool PictureReader::isWithoutKeyBetween(std::int64_t first, std::int64_t second) const
+{
+    const auto keyBeside = [&](int direction) {
+        return avformat_index_get_entry_from_timestamp(m_stream, second, direction);
+    };
+    const AVIndexEntry* const before = keyBeside(AVSEEK_FLAG_BACKWARD);
+    if (!before || before->timestamp > first)
+        return false;
+    // An index that is made while the file is read ends where nobody has read yet.
+    return keyBeside(0) != nullptr;
+}
+
+} // namespace standin

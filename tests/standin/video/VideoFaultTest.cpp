@@ -1,0 +1,193 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// Files that have no pictures, or not all of them.
+
+#include "standin/video/VideoError.h"
+#include "standin/video/VideoFile.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/video/TestVideos.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <functional>
+#include <optional>
+#include <string>
+
+#include <sys/stat.h>
+
+namespace standin::tests {
+
+namespace fs = std::filesystem;
+
+using cadrel::tests::contentOf;
+using cadrel::tests::TempFolder;
+using Reason = VideoError::Reason;
+
+namespace {
+
+constexpr PictureSize Box{320, 320};
+const std::string H264 = "-c:v libx264 -preset veryfast -pix_fmt yuv420p -g 24 ";
+const VideoRecipe Film{"film.mp4", 200, "25", H264 + "-movflags +faststart "};
+
+std::optional<Reason> reasonOf(const std::function<void()>& action)
+{
+    try {
+        action();
+    } catch (const VideoError& error) {
+        return error.reason();
+    }
+    return std::nullopt;
+}
+
+std::optional<Reason> reasonToOpen(const fs::path& file)
+{
+    return reasonOf([&] { const VideoFile opened(file, inGoodTime()); });
+}
+
+/// A file that ffmpeg makes of what its inputs are.
+fs::path madeFile(const TempFolder& folder, const std::string& name, const std::string& arguments)
+{
+    const fs::path file = folder / name;
+    EXPECT_EQ(std::system(("ffmpeg -nostdin -v error -y " + arguments + " '" + file.string() + "'").c_str()), 0);
+    return file;
+}
+
+} // namespace
+
+TEST(VideoFault, AFileThatIsNotThereIsMissing)
+{
+    const TempFolder folder;
+
+    EXPECT_EQ(reasonToOpen(folder / "none.mov"), Reason::Missing);
+}
+
+TEST(VideoFault, SoundHasNoPicture)
+{
+    const TempFolder folder;
+
+    EXPECT_EQ(reasonToOpen(madeFile(folder, "sound.wav", "-f lavfi -i sine=duration=1")), Reason::NoPicture);
+    EXPECT_EQ(reasonToOpen(madeFile(folder, "sound.mov", "-f lavfi -i sine=duration=1 -c:a pcm_s16le")),
+              Reason::NoPicture);
+}
+
+TEST(VideoFault, ThePictureOfAnAlbumIsNoFilm)
+{
+    const TempFolder folder;
+    const fs::path cover = madeFile(folder, "cover.png", "-f lavfi -i color=red:s=64x64 -frames:v 1");
+    const fs::path album = madeFile(folder, "album.m4a",
+                                    "-f lavfi -i sine=duration=1 -i '" + cover.string() +
+                                        "' -map 0 -map 1 -c:a aac -c:v png -disposition:v attached_pic");
+
+    EXPECT_EQ(reasonToOpen(album), Reason::NoPicture);
+}
+
+TEST(VideoFault, WhatIsNoVideoIsBroken)
+{
+    const TempFolder folder;
+
+    EXPECT_EQ(reasonToOpen(folder.write("empty.mov", "")), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.write("text.mov", "This is a text, not a film.\n")), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.path()), Reason::Broken);
+}
+
+TEST(VideoFault, APipeIsNotWaitedFor)
+{
+    const TempFolder folder;
+    const fs::path pipe = folder / "pipe.mov";
+    ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
+
+    EXPECT_EQ(reasonToOpen(pipe), Reason::Broken);
+}
+
+TEST(VideoFault, NothingButFilesOfThisMachineIsOpened)
+{
+    const TempFolder folder;
+    // A play list of another machine's files, in a file that is here.
+    const fs::path list = folder.write("list.m3u8", "#EXTM3U\n#EXT-X-TARGETDURATION:4\n#EXTINF:4,\n"
+                                                    "http://127.0.0.1:9/film.ts\n#EXT-X-ENDLIST\n");
+
+    EXPECT_NE(reasonToOpen(list), std::nullopt);
+    EXPECT_EQ(reasonToOpen("http://127.0.0.1:9/film.mp4"), Reason::Missing);
+}
+
+TEST(VideoFault, AFileThatLostItsEndHasNoMoreThanIsLeft)
+{
+    const TempFolder folder;
+    const std::string whole = contentOf(videoOf(Film));
+    const fs::path half = folder.write("half.mp4", whole.substr(0, whole.size() * 6 / 10));
+    VideoFile file(half, inGoodTime());
+
+    const std::uint32_t count = file.frameCount({25, 1});
+
+    EXPECT_GT(count, 50U);
+    EXPECT_LT(count, 200U);
+    for (std::uint32_t frame = 0; frame < count; frame += 7)
+        EXPECT_EQ(numberIn(file.picture(frame, {25, 1}, Box, inGoodTime())), static_cast<int>(frame));
+    EXPECT_EQ(reasonOf([&] { file.picture(count, {25, 1}, Box, inGoodTime()); }), Reason::PastTheEnd);
+    EXPECT_EQ(reasonOf([&] { file.picture(199, {25, 1}, Box, inGoodTime()); }), Reason::PastTheEnd);
+}
+
+TEST(VideoFault, AFileThatLostItsIndexIsBroken)
+{
+    const TempFolder folder;
+    // The index of this one stands at its end.
+    const std::string whole = contentOf(videoOf({"index-last.mp4", 100, "25", H264}));
+
+    EXPECT_EQ(reasonToOpen(folder.write("half.mp4", whole.substr(0, whole.size() / 2))), Reason::Broken);
+}
+
+TEST(VideoFault, TheFramesAroundABrokenPartAreStillShown)
+{
+    const TempFolder folder;
+    for (const char* const name : {"film.mp4", "film.ts", "film.mkv"}) {
+        std::string bytes = contentOf(videoOf({name, 200, "25", H264 + "-bf 2 "}));
+        // A stretch in the middle is overwritten.
+        const std::size_t middle = bytes.size() / 2;
+        for (std::size_t at = middle; at < middle + 3000; ++at)
+            bytes[at] = static_cast<char>(at * 37);
+        const fs::path broken = folder.write(name, bytes);
+        VideoFile file(broken, inGoodTime());
+        int right = 0;
+        for (std::uint32_t frame = 0; frame < 200; ++frame) {
+            int number = -1;
+            if (!reasonOf([&] {
+                    number = numberIn(file.picture(frame, {25, 1}, Box, inGoodTime()));
+                }) &&
+                number == static_cast<int>(frame))
+                ++right;
+        }
+        EXPECT_GT(right, 100) << name;
+        EXPECT_EQ(numberIn(file.picture(0, {25, 1}, Box, inGoodTime())), 0) << name;
+    }
+}
+
+TEST(VideoFault, APictureOfTooManyPixelsIsNotRead)
+{
+    const TempFolder folder;
+    // A file that claims to have a picture of 16384 by 16384 pixels.
+    const fs::path large = madeFile(folder, "large.mov", "-f lavfi -i color=red:s=16384x4096 -frames:v 1 -c:v mjpeg");
+
+    EXPECT_EQ(reasonToOpen(large), Reason::TooLarge);
+}
+
+TEST(VideoFault, WhatIsNotThereInTimeIsGivenUp)
+{
+    const fs::path path = videoOf(Film);
+    const Deadline past = std::chrono::steady_clock::now() - std::chrono::seconds(1);
+
+    EXPECT_EQ(reasonOf([&] { const VideoFile opened(path, past); }), Reason::TooSlow);
+    VideoFile file(path, inGoodTime());
+    EXPECT_EQ(reasonOf([&] { file.picture(100, {25, 1}, Box, past); }), Reason::TooSlow);
+    EXPECT_EQ(numberIn(file.picture(100, {25, 1}, Box, inGoodTime())), 100);
+}
+
+TEST(VideoError, EachReasonHasASentence)
+{
+    for (const Reason reason :
+         {Reason::Missing, Reason::NoPicture, Reason::Broken, Reason::TooLarge, Reason::TooSlow, Reason::PastTheEnd})
+        EXPECT_TRUE(std::string(VideoError(reason).what()).ends_with("."));
+}
+
+} // namespace standin::tests

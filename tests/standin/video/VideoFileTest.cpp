@@ -1,0 +1,118 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "standin/video/VideoFile.h"
+
+#include "standin/video/VideoError.h"
+#include "tests/support/video/TestVideos.h"
+
+#include <gtest/gtest.h>
+
+#include <optional>
+#include <random>
+#include <string>
+#include <vector>
+
+namespace standin::tests {
+
+using Reason = VideoError::Reason;
+
+namespace {
+
+constexpr PictureSize Box{320, 320};
+
+const std::string H264 = "-c:v libx264 -preset veryfast -pix_fmt yuv420p ";
+/// Three B frames between others, key pictures every two seconds, and B frames that need pictures of both groups.
+const std::string OpenGroups =
+    H264 + "-bf 3 -x264-params keyint=48:min-keyint=48:scenecut=0:open-gop=1:b-pyramid=normal ";
+const std::string Mpeg2 = "-c:v mpeg2video -b:v 3M -g 15 -bf 2 ";
+const std::string ProRes = "-c:v prores_ks -profile:v 0 ";
+const std::string Film = "24000/1001";
+const std::string Television = "30000/1001";
+
+std::vector<VideoRecipe> recipes()
+{
+    std::vector<VideoRecipe> all;
+    for (const std::string& rate : {Film, Television}) {
+        const std::string label = rate == Film ? "film" : "television";
+        // The timecode of the file counts drop-frame at 29.97.
+        const std::string timecode = rate == Film ? "-timecode 01:00:59:12 " : "-timecode '01:00:59;20' ";
+        all.push_back({label + ".mp4", 300, rate, OpenGroups + timecode});
+        all.push_back({label + ".mov", 300, rate, OpenGroups + timecode});
+        all.push_back({label + ".ts", 300, rate, OpenGroups});
+        all.push_back({label + ".mkv", 300, rate, OpenGroups});
+        all.push_back({label + ".mxf", 300, rate, Mpeg2 + timecode});
+        all.push_back({label + ".mpg", 300, rate, Mpeg2 + "-f vob "});
+        all.push_back({label + "-prores.mov", 300, rate, ProRes + timecode});
+    }
+    return all;
+}
+
+double rateOf(const VideoRecipe& recipe)
+{
+    return recipe.rate == Film ? 23.976 : 29.97;
+}
+
+/// The number in the picture of a frame, or why there is none.
+struct Seen {
+    int number = -1;
+    std::optional<Reason> reason;
+};
+
+Seen see(VideoFile& file, std::uint32_t frame, Ratio rate)
+{
+    try {
+        return {numberIn(file.picture(frame, rate, Box, inGoodTime())), std::nullopt};
+    } catch (const VideoError& error) {
+        return {-1, error.reason()};
+    }
+}
+
+class VideoFileOfEachKind : public testing::TestWithParam<VideoRecipe> {};
+
+} // namespace
+
+TEST_P(VideoFileOfEachKind, ShowsTheFirstTheSecondAndTheLastFrameAndNothingPastTheEnd)
+{
+    VideoFile file(videoOf(GetParam()), inGoodTime());
+    const Ratio rate = exactRate(rateOf(GetParam()));
+
+    EXPECT_EQ(file.rate(), rate);
+    ASSERT_EQ(file.frameCount(rate), 300U);
+    for (const std::uint32_t frame : {0U, 1U, 299U, 298U, 2U, 0U})
+        EXPECT_EQ(see(file, frame, rate).number, static_cast<int>(frame));
+    EXPECT_EQ(see(file, 300, rate).reason, Reason::PastTheEnd);
+    EXPECT_EQ(see(file, 0xffffffff, rate).reason, Reason::PastTheEnd);
+    EXPECT_EQ(see(file, 299, rate).number, 299);
+}
+
+TEST_P(VideoFileOfEachKind, ShowsEachOf60RandomFrames)
+{
+    VideoFile file(videoOf(GetParam()), inGoodTime());
+    const Ratio rate = exactRate(rateOf(GetParam()));
+    std::mt19937 random(17);
+
+    for (int round = 0; round < 60; ++round) {
+        const auto frame = static_cast<std::uint32_t>(random() % 300U);
+        EXPECT_EQ(see(file, frame, rate).number, static_cast<int>(frame));
+    }
+}
+
+TEST_P(VideoFileOfEachKind, ShowsEachFrameForwardsAndBackwards)
+{
+    VideoFile file(videoOf(GetParam()), inGoodTime());
+    const Ratio rate = exactRate(rateOf(GetParam()));
+
+    for (std::uint32_t frame = 0; frame < 300; ++frame)
+        ASSERT_EQ(see(file, frame, rate).number, static_cast<int>(frame));
+    for (std::uint32_t frame = 300; frame-- > 0;)
+        ASSERT_EQ(see(file, frame, rate).number, static_cast<int>(frame));
+}
+
+INSTANTIATE_TEST_SUITE_P(Videos, VideoFileOfEachKind, testing::ValuesIn(recipes()), [](const auto& tested) {
+    std::string name = tested.param.name;
+    for (char& character : name)
+        character = std::isalnum(static_cast<unsigned char>(character)) ? character : '_';
+    return name;
+});
+
+} // namespace standin::tests
