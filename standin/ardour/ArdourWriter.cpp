@@ -196,7 +196,7 @@ void ArdourWriter::writeLocations()
             continue;
         for (const Node* marker = track->firstChild(); marker; marker = track->childBehind(*marker)) {
             const std::u16string name = isOwn ? ownLocationName(track->name(), marker->name()) : marker->name();
-            const SessionId id = write(*marker, toUtf8(name));
+            const SessionId id = write(*marker, withoutForbidden(toUtf8(name)));
             if (isOwn)
                 m_ownMarkers.push_back(id);
         }
@@ -214,9 +214,12 @@ void ArdourWriter::writeSessionRange()
 {
     if (!m_session.sessionRange)
         return;
-    // It ends with the programme when that ends elsewhere now, and where it was set to end.
-    const double end = contentEnd(m_project) == m_session.contentEnd ? m_project.setEndTime() : contentEnd(m_project);
-    const std::int64_t samples = std::max(m_session.clock.samplesOf(end), m_session.sessionRange->start);
+    // It ends where the project was set to end or, where nobody has done so, with the last clip if that ends elsewhere now.
+    const SessionClock& clock = m_session.clock;
+    std::int64_t samples = clock.samplesOf(m_project.setEndTime());
+    if (samples == m_session.sessionRange->end && contentEnd(m_project) != m_session.contentEnd)
+        samples = clock.samplesOf(contentEnd(m_project));
+    samples = std::max(samples, m_session.sessionRange->start);
     if (samples == m_session.sessionRange->end)
         return;
     Element element(m_session.sessionRange->text, m_session.text);

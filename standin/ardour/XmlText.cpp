@@ -99,6 +99,25 @@ std::string printed(const pugi::xml_node& node, unsigned depth)
     return first == std::string::npos ? std::string() : writer.text.substr(first, last + 1 - first);
 }
 
+std::string withoutForbidden(std::string text)
+{
+    constexpr std::string_view Replacement = "\xEF\xBF\xBD";
+    std::string allowed;
+    allowed.reserve(text.size());
+    for (std::size_t at = 0; at < text.size();) {
+        const std::string_view rest = std::string_view(text).substr(at);
+        const auto byte = static_cast<unsigned char>(rest.front());
+        const bool isControl = byte < 0x20U && Blanks.find(rest.front()) == std::string_view::npos;
+        const bool isNoCharacter = rest.starts_with("\xEF\xBF\xBE") || rest.starts_with("\xEF\xBF\xBF");
+        if (isControl || isNoCharacter)
+            allowed += Replacement;
+        else
+            allowed += rest.front();
+        at += isNoCharacter ? 3 : 1;
+    }
+    return allowed;
+}
+
 void TextPatch::remove(TextRange range)
 {
     while (range.begin > 0 && Blanks.find(m_text[range.begin - 1]) != std::string_view::npos)

@@ -30,6 +30,9 @@ unsigned depthOf(const TextRange& element, std::string_view text);
 /// An element as text, to be put where one stands so deep; without the blanks before it.
 std::string printed(const pugi::xml_node& node, unsigned depth);
 
+/// A text as XML can hold it: with U+FFFD for each character that no XML 1.0 text may have (section 2.2). It has to be UTF-8.
+std::string withoutForbidden(std::string text);
+
 /// A text in which some stretches are put in place of others, so that all else stays as it was, to the byte.
 class TextPatch {
 public:

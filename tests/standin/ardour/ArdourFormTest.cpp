@@ -2,6 +2,8 @@
 
 #include "standin/ardour/ArdourForm.h"
 
+#include "standin/ardour/XmlText.h"
+
 #include "standin/project/AutomationPoint.h"
 #include "standin/project/Marker.h"
 #include "standin/project/MediaClip.h"
@@ -117,9 +119,9 @@ TEST(ArdourForm, ReadsEachRate)
 
 TEST(ArdourForm, ReadsWhereTimecodeBegins)
 {
-    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "172800000", .offsetIsNegative = "0"}).project->timeOrigin(),
+    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "172800000", .offsetIsNegative = "1"}).project->timeOrigin(),
               3600.0);
-    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "48000", .offsetIsNegative = "1"}).project->timeOrigin(),
+    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "48000", .offsetIsNegative = "0"}).project->timeOrigin(),
               -1.0);
 }
 
@@ -198,6 +200,33 @@ TEST(ArdourForm, ReadsABusThatHasAutomation)
     const std::string bus = R"(<Route id="22" name="Bus" default-type="audio">)";
     EXPECT_EQ(SessionProject(SessionText{.routes = bus + gain("a0 1") + "</Route>"}).project->allTracks().size(), 2U);
     EXPECT_EQ(SessionProject(SessionText{.routes = bus + "</Route>"}).project->allTracks().size(), 1U);
+}
+
+TEST(ArdourForm, ReadsAndWritesAVcaAsABus)
+{
+    std::string text = SessionText();
+    const std::string vca = "<VCAManager><VCA name=\"VCA 1\" number=\"1\">" +
+                            list("gain", "Exponential", "a0 1 a282240000 0.5") + "</VCA></VCAManager>";
+    text.insert(text.find("  <Playlists>"), vca);
+    const SessionProject session(text);
+    EXPECT_EQ(session.text(), text);
+    Envelope& curve = *session.track("VCA 1").curves().rbegin()->second;
+    ASSERT_EQ(curve.childCount(), 2U);
+    curve.lastChild()->setSpan(2.0, 2.0);
+    EXPECT_TRUE(contains(session.text(), "a0 1\na564480000 0.5\n"));
+}
+
+TEST(ArdourForm, ReadsACombinedRegion)
+{
+    const std::string nested =
+        R"(<NestedSource><Source name="comp" type="audio" id="77" playlist="78"/></NestedSource>)";
+    const std::string combined =
+        R"(<Region name="r" start="a0" length="a282240000@a0" id="51" type="audio" source-0="77">)" + nested +
+        "</Region>";
+    const std::string text = SessionText{.regions = combined};
+    const SessionProject session(text);
+    EXPECT_EQ(session.track("Dia").childCount(), 1U);
+    EXPECT_EQ(session.text(), text);
 }
 
 TEST(ArdourForm, LeavesMidiTracksAlone)
@@ -478,6 +507,19 @@ TEST_F(OwnContent, ComesBackWithTheSession)
     EXPECT_EQ(own.firstChild()->end(), 2.0);
     EXPECT_EQ(std::get<std::string>(own.firstChild()->attributes().at("note").value), "kept");
     EXPECT_EQ(again.track("Markers").childCount(), 1U);
+}
+
+TEST_F(OwnContent, HasNoCharacterThatXmlCannotHold)
+{
+    marker->setName(u"a\x0001"
+                    u"b\uFFFEc");
+    session.project->setAttribute("text", Attribute{std::string("\x01\xEF\xBF\xBF"), true});
+    const std::string text = session.text();
+    EXPECT_EQ(withoutForbidden(text), text);
+    EXPECT_FALSE(contains(text, "&#1;"));
+    const SessionProject again(text);
+    EXPECT_EQ(again.track("Insert").firstChild()->name(), u"a\uFFFDb\uFFFDc");
+    EXPECT_EQ(std::get<std::string>(again.project->attributes().at("text").value), "\x01\xEF\xBF\xBF");
 }
 
 TEST_F(OwnContent, IsWrittenTheSameWhenNothingHasChanged)

@@ -46,6 +46,18 @@ TEST(XmlText, TellsHowDeepAnElementStands)
     EXPECT_EQ(depthOf({0, text.size()}, text), 0U);
 }
 
+TEST(XmlText, ReplacesWhatXmlCannotHold)
+{
+    EXPECT_EQ(withoutForbidden("a\x01"
+                               "b\x0B"
+                               "c\x1F\t\r\n\x7F"),
+              "a\xEF\xBF\xBD"
+              "b\xEF\xBF\xBD"
+              "c\xEF\xBF\xBD\t\r\n\x7F");
+    EXPECT_EQ(withoutForbidden("\xEF\xBF\xBE|\xEF\xBF\xBF|\xEF\xBF\xBD|\xC3\xA4"),
+              "\xEF\xBF\xBD|\xEF\xBF\xBD|\xEF\xBF\xBD|\xC3\xA4");
+}
+
 TEST(TextPatch, LeavesAllElseAsItWas)
 {
     const std::string text = "one two  three";
