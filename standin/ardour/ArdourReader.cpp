@@ -510,6 +510,10 @@ void ArdourReader::readLocations(Project& project)
     if (locations)
         m_session.locationsElement = rangeOf(locations);
     const SessionClock& clock = m_session.clock;
+    const auto stays = [this](const ArdourSession::Location& location) {
+        m_session.staying.push_back((location.isRange ? "the range " : "the mark ") +
+                                    quoted(std::string_view(location.name)));
+    };
     for (const pugi::xml_node& location : locations.children("Location")) {
         const SessionId id = idOf(location);
         const std::string_view flags = location.attribute("flags").value();
@@ -527,7 +531,10 @@ void ArdourReader::readLocations(Project& project)
         } else if (hasFlag(flags, "IsAutoLoop")) {
             project.cycleLeft().setValue(0, clock.secondsOf(read.start));
             project.cycleRight().setValue(0, clock.secondsOf(read.end));
-        } else if (!hasFlag(flags, "IsAutoPunch")) {
+            stays(read);
+        } else if (hasFlag(flags, "IsAutoPunch") || hasFlag(flags, "IsClockOrigin")) {
+            stays(read);
+        } else {
             if (!m_session.locations.emplace(id, std::move(read)).second)
                 throw FileFault("Locations", "has two with the id " + std::to_string(id));
             m_order.push_back(id);

@@ -206,8 +206,12 @@ void ArdourWriter::writeLocations()
             m_patch.remove(location.text);
     }
     writeSessionRange();
-    if (!added.empty())
+    if (added.empty())
+        return;
+    if (m_session.locationsElement.end != 0)
         insertInto(m_session.locationsElement, "Locations", std::move(added));
+    else
+        insertInto(m_session.element, "Session", "\n  <Locations>" + added + "\n  </Locations>");
 }
 
 void ArdourWriter::writeSessionRange()
@@ -256,15 +260,11 @@ void ArdourWriter::writeIdCounter()
 {
     if (m_nextId == m_session.largestId + 1)
         return;
-    // Of the start tag of a session no value but this one is a counter of ids.
-    const TextRange tag = startTagOf(m_session.element, m_session.text);
-    constexpr std::string_view Name = " id-counter=";
-    const std::size_t found = tag.in(m_session.text).find(Name);
-    if (found == std::string_view::npos)
+    const std::optional<TextRange> counter =
+        valueIn(startTagOf(m_session.element, m_session.text), "id-counter", m_session.text);
+    if (!counter)
         throw FileFault("the session doesn't count its ids");
-    const std::size_t begin = tag.begin + found + Name.size() + 1;
-    const std::size_t end = m_session.text.find(m_session.text[begin - 1], begin);
-    m_patch.replace({begin, end}, std::to_string(m_nextId));
+    m_patch.replace(*counter, std::to_string(m_nextId));
 }
 
 void ArdourWriter::insertInto(const TextRange& element, const std::string& name, std::string text)

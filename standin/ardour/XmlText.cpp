@@ -82,6 +82,25 @@ TextRange startTagOf(const TextRange& element, std::string_view text)
     return {element.begin, endOfTag(text, element.begin)};
 }
 
+std::optional<TextRange> valueIn(const TextRange& startTag, std::string_view name, std::string_view text)
+{
+    constexpr std::string_view AroundNames = " \t\r\n=";
+    std::size_t at = startTag.begin;
+    while (true) {
+        const std::size_t open = text.find_first_of("\"'", at);
+        if (open >= startTag.end)
+            return std::nullopt;
+        const std::size_t close = text.find(text[open], open + 1);
+        if (close >= startTag.end)
+            return std::nullopt;
+        const std::size_t last = text.find_last_not_of(AroundNames, open - 1);
+        const std::size_t first = text.find_last_of(AroundNames, last) + 1;
+        if (text.substr(first, last + 1 - first) == name)
+            return TextRange{open + 1, close};
+        at = close + 1;
+    }
+}
+
 unsigned depthOf(const TextRange& element, std::string_view text)
 {
     const std::size_t before = text.substr(0, element.begin).find_last_not_of(' ');

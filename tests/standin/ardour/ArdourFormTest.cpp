@@ -251,6 +251,7 @@ TEST(ArdourForm, ReadsMarksAndRangesAsMarkers)
     const SessionProject session(SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange") +
                                                           location(62, "loop", 48000, 96000, "IsAutoLoop,IsHidden") +
                                                           location(63, "punch", 48000, 96000, "IsAutoPunch") +
+                                                          location(66, "start", 0, 0, "IsMark,IsClockOrigin") +
                                                           location(64, "scene 4", 144000, 144000, "IsMark") +
                                                           location(65, "music", 96000, 192000, "IsRangeMarker")});
     Track& markers = session.track("Markers");
@@ -573,6 +574,21 @@ TEST_F(OwnContent, StandsBesideWhatOthersHaveInTheExtraElement)
     EXPECT_EQ(Parsed(text).all("//Extra").size(), 1U);
 }
 
+TEST_F(OwnContent, GivesASessionWithoutLocationsSome)
+{
+    std::string text = SessionText();
+    text.erase(text.find("<Locations></Locations>"), 23);
+    text.insert(text.find(" name="), " note=\" id-counter=7\"");
+    const SessionProject other(text);
+    const auto own = Track::create(Track::Kind::Marker);
+    Velmark::makeCounted<Marker>(false)->insertInto(*own);
+    own->insertInto(*other.project);
+    const std::string written = other.text();
+    EXPECT_EQ(Parsed(written).all("/Session/Locations/Location").size(), 1U);
+    EXPECT_STREQ(Parsed(written).one("/Session").attribute("note").value(), " id-counter=7");
+    EXPECT_STREQ(Parsed(written).one("/Session").attribute("id-counter").value(), "2002");
+}
+
 TEST_F(OwnContent, LeavesAnEmptyExtraElementAndEmptyLocationsWhole)
 {
     std::string text = SessionText{.extra = "<Extra/>"};
@@ -645,6 +661,11 @@ TEST_F(SessionFolder, StandsForItsOnlySession)
     EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
     put("other.ardour", "<Session/>");
     EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);
+    // Of several the one counts that is named as the folder is, as Ardour names it at first.
+    const std::string first = folder.filename().string() + ".ardour";
+    put(first, "<Session/>");
+    EXPECT_EQ(ProjectFile::fileIn(folder), folder / first);
+    std::filesystem::remove(folder / first);
     std::filesystem::remove(folder / "other.ardour");
     std::filesystem::remove(folder / "reel.ardour");
     EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);
@@ -658,6 +679,10 @@ TEST(ArdourForm, TellsWhatNoEditMoves)
                                  R"(<Playlist id="33" name="Dia.1" type="audio"/>)"});
     EXPECT_EQ(session.project->form()->staying(),
               (std::vector<std::string>{"the MIDI track \"Piano\"", "the playlist \"Dia.1\""}));
+    const SessionProject marked(SessionText{.locations = location(62, "Loop", 48000, 96000, "IsAutoLoop,IsHidden") +
+                                                         location(66, "start", 0, 0, "IsMark,IsClockOrigin")});
+    EXPECT_EQ(marked.project->form()->staying(),
+              (std::vector<std::string>{"the range \"Loop\"", "the mark \"start\""}));
 }
 
 TEST_F(SessionFolder, PutsTheHistoryAsideWhoseRegionsMayBeOthersNow)

@@ -38,6 +38,16 @@ TEST(XmlText, FindsAStartTag)
     EXPECT_EQ(startTagOf({0, text.size()}, text).in(text), "<a x=\">\">");
 }
 
+TEST(XmlText, FindsTheValueOfAnAttribute)
+{
+    const std::string text = "<a note=\" id=7\" xid='8' id = '9' empty=\"\"/>";
+    const TextRange tag{0, text.size()};
+    EXPECT_EQ(valueIn(tag, "id", text)->in(text), "9");
+    EXPECT_EQ(valueIn(tag, "note", text)->in(text), " id=7");
+    EXPECT_EQ(valueIn(tag, "empty", text)->in(text), "");
+    EXPECT_FALSE(valueIn(tag, "other", text));
+}
+
 TEST(XmlText, TellsHowDeepAnElementStands)
 {
     const std::string text = "<a>\n    <b/><c/>\n</a>";
