@@ -113,6 +113,17 @@ std::u16string markerName(std::string_view location, const Track& track)
     return name.starts_with(longer.substr(0, size)) ? name.substr(size) : name;
 }
 
+bool hasPoints(const Track& track)
+{
+    return std::ranges::any_of(track.curves(), [](const auto& curve) { return curve.second->firstChild() != nullptr; });
+}
+
+/// A VCA has a number of its own in place of an id.
+SessionId vcaKey(SessionId number)
+{
+    return -number;
+}
+
 class IdCollector : public pugi::xml_tree_walker {
 public:
     bool for_each(pugi::xml_node& node) override
@@ -177,6 +188,7 @@ Counted<Project> ArdourReader::read(ChangeLog& log)
     findExtra();
     const Counted<Project> project =
         m_session.ownText.empty() ? makeCounted<Project>(log) : ProjectReader::read(m_session.ownText, log);
+    m_project = project.get();
     readClock(*project);
     readSources(*project);
     readRoutes(*project);
@@ -234,8 +246,8 @@ void ArdourReader::readClock(Project& project)
         throw FileFault("timecode-offset",
                         "is " + quoted(std::string_view(offset)) + ", which is no number of samples");
     const double seconds = m_session.clock.secondsOf(*samples);
-    // With the option on, timecode is behind the session's own time by so much.
-    project.setTimeOrigin(optionOf("timecode-offset-negative") == "0" ? seconds : -seconds);
+    // The option is named after what is done with a timecode to get a time of the session.
+    project.setTimeOrigin(optionOf("timecode-offset-negative") == "0" ? -seconds : seconds);
 }
 
 void ArdourReader::readSources(Project& project)
@@ -285,6 +297,8 @@ void ArdourReader::readRoutes(Project& project)
     }
     for (const pugi::xml_node& route : m_root.child("Routes").children("Route"))
         readRoute(route, project);
+    for (const pugi::xml_node& vca : m_root.child("VCAManager").children("VCA"))
+        readVca(vca, project);
     for (const auto& [id, playlist] : m_playlists) {
         if (!m_playlistsRead.contains(id) && std::strcmp(playlist.attribute("type").value(), "audio") == 0)
             m_session.staying.push_back("the playlist " + quoted(playlist.attribute("name").value()));
@@ -301,17 +315,7 @@ void ArdourReader::readRoute(const pugi::xml_node& route, Project& project)
         m_session.staying.push_back("the MIDI track " + quoted(std::string_view(name)));
         return;
     }
-    // What Cadrel has stored of a track comes first, and so does its place.
-    Counted<Track> track;
-    for (Track* const candidate : project.allTracks()) {
-        if (candidate->kind() == Track::Kind::Audio && attributeId(*candidate, SessionKey::Route) == id)
-            track = Counted<Track>::share(candidate);
-    }
-    if (track)
-        track->remove();
-    else
-        track = Track::create(Track::Kind::Audio);
-    setId(*track, SessionKey::Route, id);
+    const Counted<Track> track = trackOf(id, project);
     track->setName(textOf(name));
     readLists(id, route, *track);
 
@@ -329,9 +333,36 @@ void ArdourReader::readRoute(const pugi::xml_node& route, Project& project)
             playlist->second.parent().remove_child(playlist->second);
         }
     }
-    const bool hasPoints = std::ranges::any_of(track->curves(), [](const auto& c) { return c.second->firstChild(); });
-    if (ownPlaylist || hasPoints)
+    if (ownPlaylist || hasPoints(*track))
         track->insertInto(project);
+}
+
+void ArdourReader::readVca(const pugi::xml_node& vca, Project& project)
+{
+    const std::optional<SessionId> number = idIn(vca.attribute("number").value());
+    if (!number || *number == 0)
+        throw FileFault("VCAManager", "has a VCA without a number");
+    const SessionId key = vcaKey(*number);
+    const Counted<Track> track = trackOf(key, project);
+    track->setName(textOf(vca.attribute("name").value()));
+    readLists(key, vca, *track);
+    if (hasPoints(*track))
+        track->insertInto(project);
+}
+
+Counted<Track> ArdourReader::trackOf(SessionId route, Project& project)
+{
+    // What Cadrel has stored of a track comes first.
+    for (Track* const candidate : project.allTracks()) {
+        if (candidate->kind() == Track::Kind::Audio && attributeId(*candidate, SessionKey::Route) == route) {
+            auto stored = Counted<Track>::share(candidate);
+            stored->remove();
+            return stored;
+        }
+    }
+    const Counted<Track> track = Track::create(Track::Kind::Audio);
+    setId(*track, SessionKey::Route, route);
+    return track;
 }
 
 void ArdourReader::readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track)
@@ -369,7 +400,16 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
         throw FileFault(quoted(std::string_view(name)),
                         "has the id " + std::to_string(id) + ", which is another region's");
 
-    const auto clip = m_clips.find(idIn(region.attribute("source-0").value()).value_or(-1));
+    const SessionId source = idIn(region.attribute("source-0").value()).value_or(-1);
+    // What a combined region plays stands in the region itself.
+    const pugi::xml_node nested = region.child("NestedSource").child("Source");
+    if (nested && !m_clips.contains(source) && idIn(nested.attribute("id").value()) == source) {
+        const auto combined = makeCounted<MediaClip>(MediaClip::Kind::Audio, textOf(nested.attribute("name").value()),
+                                                     clock.secondsOf(read.start + read.length));
+        m_clips.emplace(source, combined);
+        m_project->pool().add(combined);
+    }
+    const auto clip = m_clips.find(source);
     if (clip == m_clips.end()) {
         throw FileFault(name,
                         "plays the source " + quoted(region.attribute("source-0").value()) + ", which isn't there");
@@ -455,6 +495,8 @@ void ArdourReader::dropGoneTracks(Project& project)
     std::set<SessionId> routes;
     for (const pugi::xml_node& route : m_root.child("Routes").children("Route"))
         routes.insert(idOf(route));
+    for (const pugi::xml_node& vca : m_root.child("VCAManager").children("VCA"))
+        routes.insert(vcaKey(idIn(vca.attribute("number").value()).value_or(0)));
     for (Track* const track : project.allTracks()) {
         const SessionId route = attributeId(*track, SessionKey::Route);
         if (route != 0 && !routes.contains(route))
@@ -468,6 +510,10 @@ void ArdourReader::readLocations(Project& project)
     if (locations)
         m_session.locationsElement = rangeOf(locations);
     const SessionClock& clock = m_session.clock;
+    const auto stays = [this](const ArdourSession::Location& location) {
+        m_session.staying.push_back((location.isRange ? "the range " : "the mark ") +
+                                    quoted(std::string_view(location.name)));
+    };
     for (const pugi::xml_node& location : locations.children("Location")) {
         const SessionId id = idOf(location);
         const std::string_view flags = location.attribute("flags").value();
@@ -485,7 +531,10 @@ void ArdourReader::readLocations(Project& project)
         } else if (hasFlag(flags, "IsAutoLoop")) {
             project.cycleLeft().setValue(0, clock.secondsOf(read.start));
             project.cycleRight().setValue(0, clock.secondsOf(read.end));
-        } else if (!hasFlag(flags, "IsAutoPunch")) {
+            stays(read);
+        } else if (hasFlag(flags, "IsAutoPunch") || hasFlag(flags, "IsClockOrigin")) {
+            stays(read);
+        } else {
             if (!m_session.locations.emplace(id, std::move(read)).second)
                 throw FileFault("Locations", "has two with the id " + std::to_string(id));
             m_order.push_back(id);

@@ -40,6 +40,9 @@ private:
     void readSources(Project& project);
     void readRoutes(Project& project);
     void readRoute(const pugi::xml_node& route, Project& project);
+    void readVca(const pugi::xml_node& vca, Project& project);
+    /// The track that was stored for a route, taken out of the project, or a new one.
+    Velmark::Counted<Track> trackOf(SessionId route, Project& project);
     void readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track);
     void readRegion(const pugi::xml_node& region, Track& track);
     void readLists(SessionId route, const pugi::xml_node& node, Track& track);
@@ -55,6 +58,7 @@ private:
     ArdourSession m_session;
     std::filesystem::path m_file;
     pugi::xml_document m_document;
+    Project* m_project = nullptr; ///< what is being read
     pugi::xml_node m_root;
     std::map<SessionId, Velmark::Counted<MediaClip>> m_clips; ///< by their sources
     std::map<SessionId, pugi::xml_node> m_playlists;

@@ -196,7 +196,7 @@ void ArdourWriter::writeLocations()
             continue;
         for (const Node* marker = track->firstChild(); marker; marker = track->childBehind(*marker)) {
             const std::u16string name = isOwn ? ownLocationName(track->name(), marker->name()) : marker->name();
-            const SessionId id = write(*marker, toUtf8(name));
+            const SessionId id = write(*marker, withoutForbidden(toUtf8(name)));
             if (isOwn)
                 m_ownMarkers.push_back(id);
         }
@@ -206,17 +206,24 @@ void ArdourWriter::writeLocations()
             m_patch.remove(location.text);
     }
     writeSessionRange();
-    if (!added.empty())
+    if (added.empty())
+        return;
+    if (m_session.locationsElement.end != 0)
         insertInto(m_session.locationsElement, "Locations", std::move(added));
+    else
+        insertInto(m_session.element, "Session", "\n  <Locations>" + added + "\n  </Locations>");
 }
 
 void ArdourWriter::writeSessionRange()
 {
     if (!m_session.sessionRange)
         return;
-    // It ends with the programme when that ends elsewhere now, and where it was set to end.
-    const double end = contentEnd(m_project) == m_session.contentEnd ? m_project.setEndTime() : contentEnd(m_project);
-    const std::int64_t samples = std::max(m_session.clock.samplesOf(end), m_session.sessionRange->start);
+    // It ends where the project was set to end or, where nobody has done so, with the last clip if that ends elsewhere now.
+    const SessionClock& clock = m_session.clock;
+    std::int64_t samples = clock.samplesOf(m_project.setEndTime());
+    if (samples == m_session.sessionRange->end && contentEnd(m_project) != m_session.contentEnd)
+        samples = clock.samplesOf(contentEnd(m_project));
+    samples = std::max(samples, m_session.sessionRange->start);
     if (samples == m_session.sessionRange->end)
         return;
     Element element(m_session.sessionRange->text, m_session.text);
@@ -253,15 +260,11 @@ void ArdourWriter::writeIdCounter()
 {
     if (m_nextId == m_session.largestId + 1)
         return;
-    // Of the start tag of a session no value but this one is a counter of ids.
-    const TextRange tag = startTagOf(m_session.element, m_session.text);
-    constexpr std::string_view Name = " id-counter=";
-    const std::size_t found = tag.in(m_session.text).find(Name);
-    if (found == std::string_view::npos)
+    const std::optional<TextRange> counter =
+        valueIn(startTagOf(m_session.element, m_session.text), "id-counter", m_session.text);
+    if (!counter)
         throw FileFault("the session doesn't count its ids");
-    const std::size_t begin = tag.begin + found + Name.size() + 1;
-    const std::size_t end = m_session.text.find(m_session.text[begin - 1], begin);
-    m_patch.replace({begin, end}, std::to_string(m_nextId));
+    m_patch.replace(*counter, std::to_string(m_nextId));
 }
 
 void ArdourWriter::insertInto(const TextRange& element, const std::string& name, std::string text)

@@ -25,6 +25,17 @@ bool hasOwn(const Track& track)
     return !isOfSession(track) || track.attributes().size() > 1 || track.isLocked();
 }
 
+/// JSON can tell by its number what XML can't hold; the writer does so for all but these two.
+std::string forXml(std::string json)
+{
+    for (const auto& [character, number] :
+         {std::pair{"\xEF\xBF\xBE", "\\ufffe"}, std::pair{"\xEF\xBF\xBF", "\\uffff"}}) {
+        for (std::size_t at = json.find(character); at != std::string::npos; at = json.find(character, at))
+            json.replace(at, 3, number);
+    }
+    return json;
+}
+
 } // namespace
 
 std::string OwnStorage::textOf(const Project& project)
@@ -34,7 +45,7 @@ std::string OwnStorage::textOf(const Project& project)
         return std::string();
     // A track is asked for before what is on it.
     const Track* around = nullptr;
-    return ProjectWriter::textOf(project, [&around](const Node& node) {
+    return forXml(ProjectWriter::textOf(project, [&around](const Node& node) {
         if (const auto* const clip = dynamic_cast<const MediaClip*>(&node))
             return clip->kind() == MediaClip::Kind::Video;
         if (const auto* const track = dynamic_cast<const Track*>(&node)) {
@@ -42,7 +53,7 @@ std::string OwnStorage::textOf(const Project& project)
             return hasOwn(*track);
         }
         return !isOfSession(*around);
-    });
+    }));
 }
 
 std::vector<Node*> OwnStorage::markersOf(const Project& project)

@@ -152,6 +152,9 @@ void cutFades(pugi::xml_node& element, const RegionPiece& piece, const SessionCl
 {
     EdgeFade in(element, FadeIn, piece.head, clock);
     EdgeFade out(element, FadeOut, piece.tail, clock);
+    // Ardour lets the fades that the user has drawn overlap.
+    if (in.isOld() && out.isOld())
+        return;
     in.begin(edgeFade, newId);
     out.begin(edgeFade, newId);
     if (in.length() + out.length() <= piece.length)
@@ -179,8 +182,10 @@ void cutEnvelope(pugi::xml_node& element, const ArdourSession::Region& region, c
     const CurveScale scale(list.attribute("interpolation-style").value(), values);
     const double start = clock.secondsOf(piece.start - region.start);
     const double end = start + clock.secondsOf(piece.length);
-    const auto valueAt = [&](double seconds) {
-        const auto after = std::ranges::lower_bound(points, seconds, {}, &ListPoint::seconds);
+    // Of the points that stand at a time the envelope comes to the first and goes on from the last.
+    const auto valueAt = [&](double seconds, bool goesOn) {
+        const auto after = goesOn ? std::ranges::upper_bound(points, seconds, {}, &ListPoint::seconds)
+                                  : std::ranges::lower_bound(points, seconds, {}, &ListPoint::seconds);
         if (after == points.begin())
             return after->value;
         const ListPoint& before = *std::prev(after);
@@ -189,12 +194,12 @@ void cutEnvelope(pugi::xml_node& element, const ArdourSession::Region& region, c
         const double share = (seconds - before.seconds) / (after->seconds - before.seconds);
         return scale.toValue(std::lerp(scale.toShare(before.value), scale.toShare(after->value), share));
     };
-    ListPoints cut{{0.0, valueAt(start)}};
+    ListPoints cut{{0.0, valueAt(start, true)}};
     for (const ListPoint& point : points) {
         if (point.seconds > start && point.seconds < end)
             cut.push_back({point.seconds - start, point.value});
     }
-    cut.push_back({end - start, valueAt(end)});
+    cut.push_back({end - start, valueAt(end, false)});
     writePoints(list, cut, clock);
 }
 

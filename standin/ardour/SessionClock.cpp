@@ -55,6 +55,7 @@ SessionClock::SessionClock(const pugi::xml_node& session)
 
 void SessionClock::readTempos(const pugi::xml_node& session)
 {
+    bool continues = false;
     for (const pugi::xml_node& tempo : session.child("TempoMap").child("Tempos").children("Tempo")) {
         const double notesPerMinute = tempo.attribute("npm").as_double();
         const double endNotesPerMinute = tempo.attribute("enpm").as_double(notesPerMinute);
@@ -74,11 +75,15 @@ void SessionClock::readTempos(const pugi::xml_node& session)
             Tempo& before = m_tempos.back();
             if (at <= before.ticks || seconds <= before.seconds)
                 throw FileFault("TempoMap", "has tempos that don't follow one another");
+            // One that continues goes on to the tempo of the next, whatever end it tells.
+            if (continues)
+                before.growth = std::log(before.secondsPerQuarter / (60.0 / notesPerMinute * noteType / 4.0));
             before.growth /= seconds - before.seconds;
         }
         // Between here and the next tempo the logarithm of the tempo grows evenly with time.
         m_tempos.push_back(
             {at, seconds, 60.0 / notesPerMinute * noteType / 4.0, std::log(endNotesPerMinute / notesPerMinute)});
+        continues = tempo.attribute("continuing").as_bool();
     }
     if (!m_tempos.empty())
         m_tempos.back().growth = 0.0;

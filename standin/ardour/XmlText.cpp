@@ -82,6 +82,25 @@ TextRange startTagOf(const TextRange& element, std::string_view text)
     return {element.begin, endOfTag(text, element.begin)};
 }
 
+std::optional<TextRange> valueIn(const TextRange& startTag, std::string_view name, std::string_view text)
+{
+    constexpr std::string_view AroundNames = " \t\r\n=";
+    std::size_t at = startTag.begin;
+    while (true) {
+        const std::size_t open = text.find_first_of("\"'", at);
+        if (open >= startTag.end)
+            return std::nullopt;
+        const std::size_t close = text.find(text[open], open + 1);
+        if (close >= startTag.end)
+            return std::nullopt;
+        const std::size_t last = text.find_last_not_of(AroundNames, open - 1);
+        const std::size_t first = text.find_last_of(AroundNames, last) + 1;
+        if (text.substr(first, last + 1 - first) == name)
+            return TextRange{open + 1, close};
+        at = close + 1;
+    }
+}
+
 unsigned depthOf(const TextRange& element, std::string_view text)
 {
     const std::size_t before = text.substr(0, element.begin).find_last_not_of(' ');
@@ -97,6 +116,25 @@ std::string printed(const pugi::xml_node& node, unsigned depth)
     const std::size_t first = writer.text.find_first_not_of(Blanks);
     const std::size_t last = writer.text.find_last_not_of(Blanks);
     return first == std::string::npos ? std::string() : writer.text.substr(first, last + 1 - first);
+}
+
+std::string withoutForbidden(std::string text)
+{
+    constexpr std::string_view Replacement = "\xEF\xBF\xBD";
+    std::string allowed;
+    allowed.reserve(text.size());
+    for (std::size_t at = 0; at < text.size();) {
+        const std::string_view rest = std::string_view(text).substr(at);
+        const auto byte = static_cast<unsigned char>(rest.front());
+        const bool isControl = byte < 0x20U && Blanks.find(rest.front()) == std::string_view::npos;
+        const bool isNoCharacter = rest.starts_with("\xEF\xBF\xBE") || rest.starts_with("\xEF\xBF\xBF");
+        if (isControl || isNoCharacter)
+            allowed += Replacement;
+        else
+            allowed += rest.front();
+        at += isNoCharacter ? 3 : 1;
+    }
+    return allowed;
 }
 
 void TextPatch::remove(TextRange range)

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstddef>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -25,10 +26,15 @@ struct TextRange {
 TextRange rangeOf(const pugi::xml_node& node, std::string_view text);
 /// The start tag alone.
 TextRange startTagOf(const TextRange& element, std::string_view text);
+/// The value of an attribute in a start tag, without its quotes; nothing for one that isn't there.
+std::optional<TextRange> valueIn(const TextRange& startTag, std::string_view name, std::string_view text);
 /// How deep an element stands, by the blanks before it in its line.
 unsigned depthOf(const TextRange& element, std::string_view text);
 /// An element as text, to be put where one stands so deep; without the blanks before it.
 std::string printed(const pugi::xml_node& node, unsigned depth);
+
+/// A text as XML can hold it: with U+FFFD for each character that no XML 1.0 text may have (section 2.2). It has to be UTF-8.
+std::string withoutForbidden(std::string text);
 
 /// A text in which some stretches are put in place of others, so that all else stays as it was, to the byte.
 class TextPatch {

@@ -78,6 +78,11 @@ fs::path ProjectFile::fileIn(const fs::path& path)
     std::error_code error;
     if (!fs::is_directory(path, error))
         return path;
+    // Ardour names the first session after its folder.
+    const fs::path first = path / fs::weakly_canonical(path, error).filename().concat(ArdourForm::Extension);
+    if (!error && fs::is_regular_file(first, error))
+        return first;
+    error.clear();
     fs::path found;
     for (fs::directory_iterator entry(path, error); !error && entry != fs::directory_iterator();
          entry.increment(error)) {

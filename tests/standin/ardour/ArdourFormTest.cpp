@@ -2,6 +2,8 @@
 
 #include "standin/ardour/ArdourForm.h"
 
+#include "standin/ardour/XmlText.h"
+
 #include "standin/project/AutomationPoint.h"
 #include "standin/project/Marker.h"
 #include "standin/project/MediaClip.h"
@@ -117,9 +119,9 @@ TEST(ArdourForm, ReadsEachRate)
 
 TEST(ArdourForm, ReadsWhereTimecodeBegins)
 {
-    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "172800000", .offsetIsNegative = "0"}).project->timeOrigin(),
+    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "172800000", .offsetIsNegative = "1"}).project->timeOrigin(),
               3600.0);
-    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "48000", .offsetIsNegative = "1"}).project->timeOrigin(),
+    EXPECT_EQ(SessionProject(SessionText{.timecodeOffset = "48000", .offsetIsNegative = "0"}).project->timeOrigin(),
               -1.0);
 }
 
@@ -200,6 +202,33 @@ TEST(ArdourForm, ReadsABusThatHasAutomation)
     EXPECT_EQ(SessionProject(SessionText{.routes = bus + "</Route>"}).project->allTracks().size(), 1U);
 }
 
+TEST(ArdourForm, ReadsAndWritesAVcaAsABus)
+{
+    std::string text = SessionText();
+    const std::string vca = "<VCAManager><VCA name=\"VCA 1\" number=\"1\">" +
+                            list("gain", "Exponential", "a0 1 a282240000 0.5") + "</VCA></VCAManager>";
+    text.insert(text.find("  <Playlists>"), vca);
+    const SessionProject session(text);
+    EXPECT_EQ(session.text(), text);
+    Envelope& curve = *session.track("VCA 1").curves().rbegin()->second;
+    ASSERT_EQ(curve.childCount(), 2U);
+    curve.lastChild()->setSpan(2.0, 2.0);
+    EXPECT_TRUE(contains(session.text(), "a0 1\na564480000 0.5\n"));
+}
+
+TEST(ArdourForm, ReadsACombinedRegion)
+{
+    const std::string nested =
+        R"(<NestedSource><Source name="comp" type="audio" id="77" playlist="78"/></NestedSource>)";
+    const std::string combined =
+        R"(<Region name="r" start="a0" length="a282240000@a0" id="51" type="audio" source-0="77">)" + nested +
+        "</Region>";
+    const std::string text = SessionText{.regions = combined};
+    const SessionProject session(text);
+    EXPECT_EQ(session.track("Dia").childCount(), 1U);
+    EXPECT_EQ(session.text(), text);
+}
+
 TEST(ArdourForm, LeavesMidiTracksAlone)
 {
     const SessionProject session(SessionText{
@@ -222,6 +251,7 @@ TEST(ArdourForm, ReadsMarksAndRangesAsMarkers)
     const SessionProject session(SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange") +
                                                           location(62, "loop", 48000, 96000, "IsAutoLoop,IsHidden") +
                                                           location(63, "punch", 48000, 96000, "IsAutoPunch") +
+                                                          location(66, "start", 0, 0, "IsMark,IsClockOrigin") +
                                                           location(64, "scene 4", 144000, 144000, "IsMark") +
                                                           location(65, "music", 96000, 192000, "IsRangeMarker")});
     Track& markers = session.track("Markers");
@@ -480,6 +510,19 @@ TEST_F(OwnContent, ComesBackWithTheSession)
     EXPECT_EQ(again.track("Markers").childCount(), 1U);
 }
 
+TEST_F(OwnContent, HasNoCharacterThatXmlCannotHold)
+{
+    marker->setName(u"a\x0001"
+                    u"b\uFFFEc");
+    session.project->setAttribute("text", Attribute{std::string("\x01\xEF\xBF\xBF"), true});
+    const std::string text = session.text();
+    EXPECT_EQ(withoutForbidden(text), text);
+    EXPECT_FALSE(contains(text, "&#1;"));
+    const SessionProject again(text);
+    EXPECT_EQ(again.track("Insert").firstChild()->name(), u"a\uFFFDb\uFFFDc");
+    EXPECT_EQ(std::get<std::string>(again.project->attributes().at("text").value), "\x01\xEF\xBF\xBF");
+}
+
 TEST_F(OwnContent, IsWrittenTheSameWhenNothingHasChanged)
 {
     const std::string text = session.text();
@@ -529,6 +572,21 @@ TEST_F(OwnContent, StandsBesideWhatOthersHaveInTheExtraElement)
     EXPECT_TRUE(contains(text, "<Extra><Other x='1'/>"));
     EXPECT_EQ(SessionProject(text).project->attributes().size(), 1U);
     EXPECT_EQ(Parsed(text).all("//Extra").size(), 1U);
+}
+
+TEST_F(OwnContent, GivesASessionWithoutLocationsSome)
+{
+    std::string text = SessionText();
+    text.erase(text.find("<Locations></Locations>"), 23);
+    text.insert(text.find(" name="), " note=\" id-counter=7\"");
+    const SessionProject other(text);
+    const auto own = Track::create(Track::Kind::Marker);
+    Velmark::makeCounted<Marker>(false)->insertInto(*own);
+    own->insertInto(*other.project);
+    const std::string written = other.text();
+    EXPECT_EQ(Parsed(written).all("/Session/Locations/Location").size(), 1U);
+    EXPECT_STREQ(Parsed(written).one("/Session").attribute("note").value(), " id-counter=7");
+    EXPECT_STREQ(Parsed(written).one("/Session").attribute("id-counter").value(), "2002");
 }
 
 TEST_F(OwnContent, LeavesAnEmptyExtraElementAndEmptyLocationsWhole)
@@ -603,6 +661,11 @@ TEST_F(SessionFolder, StandsForItsOnlySession)
     EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
     put("other.ardour", "<Session/>");
     EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);
+    // Of several the one counts that is named as the folder is, as Ardour names it at first.
+    const std::string first = folder.filename().string() + ".ardour";
+    put(first, "<Session/>");
+    EXPECT_EQ(ProjectFile::fileIn(folder), folder / first);
+    std::filesystem::remove(folder / first);
     std::filesystem::remove(folder / "other.ardour");
     std::filesystem::remove(folder / "reel.ardour");
     EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);
@@ -616,6 +679,10 @@ TEST(ArdourForm, TellsWhatNoEditMoves)
                                  R"(<Playlist id="33" name="Dia.1" type="audio"/>)"});
     EXPECT_EQ(session.project->form()->staying(),
               (std::vector<std::string>{"the MIDI track \"Piano\"", "the playlist \"Dia.1\""}));
+    const SessionProject marked(SessionText{.locations = location(62, "Loop", 48000, 96000, "IsAutoLoop,IsHidden") +
+                                                         location(66, "start", 0, 0, "IsMark,IsClockOrigin")});
+    EXPECT_EQ(marked.project->form()->staying(),
+              (std::vector<std::string>{"the range \"Loop\"", "the mark \"start\""}));
 }
 
 TEST_F(SessionFolder, PutsTheHistoryAsideWhoseRegionsMayBeOthersNow)

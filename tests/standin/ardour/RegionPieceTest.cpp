@@ -241,6 +241,27 @@ TEST_F(CutRegion, CutsItsGainEnvelopeAndCountsItFromItsOwnStart)
                  "a0 0.75\na14700000 0.5\na29400000 0.75\n");
 }
 
+TEST_F(CutRegion, BeginsWithTheValueAfterAStepOfItsEnvelopeAndEndsWithTheOneBefore)
+{
+    // A step from 0.5 to 0.25 at sample 5,000 of the region.
+    const std::string envelope =
+        "<Envelope><AutomationList id=\"8\" interpolation-style=\"Linear\"><events>"
+        "a0 1\na29400000 0.5\na29400000 0.25\na58800000 2\n</events></AutomationList></Envelope>";
+    const auto eventsOf = [](const pugi::xml_node& element) {
+        return std::string(element.child("Envelope").child("AutomationList").child("events").text().get());
+    };
+    EXPECT_EQ(eventsOf(cut(envelope, {48000, 5000, 5500, RegionEdge::New, RegionEdge::Old})), "a0 0.25\na29400000 2\n");
+    EXPECT_EQ(eventsOf(cut(envelope, {48000, 5000, 500, RegionEdge::Old, RegionEdge::New})), "a0 1\na29400000 0.5\n");
+}
+
+TEST_F(CutRegion, KeepsFadesThatOverlapWhereItIsWhole)
+{
+    const RegionPiece moved{48000, 10000, 500, RegionEdge::Old, RegionEdge::Old};
+    const pugi::xml_node element = cut(fade("FadeIn", 7000) + fade("FadeOut", 8000), moved);
+    EXPECT_EQ(lengthOf(element, "FadeIn"), 7000);
+    EXPECT_EQ(lengthOf(element, "FadeOut"), 8000);
+}
+
 TEST_F(CutRegion, InterpolatesAnEnvelopeOfGainAsAFader)
 {
     const std::string envelope = "<Envelope><AutomationList id=\"8\" interpolation-style=\"Exponential\"><events>"

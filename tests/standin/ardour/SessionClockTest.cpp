@@ -98,6 +98,17 @@ TEST(SessionClock, CountsBeatsAlongARamp)
     EXPECT_FALSE(clock.bendsBetween(0.0, 1.0).empty());
 }
 
+TEST(SessionClock, CountsBeatsUpToTheNextTempoWhereOneContinues)
+{
+    // As above, but the first tempo doesn't tell where it leads.
+    const double quarters = 1.0 / std::log(2.0);
+    const int ticks = static_cast<int>(std::lround((quarters - 1.0) * 1920));
+    const SessionClock clock =
+        at48k(R"(<Tempo npm="60" enpm="60" continuing="1" note-type="4" sclock="0" quarters="0:0"/>)" +
+              tempo("120", "120", "282240000", "1:" + std::to_string(ticks)));
+    EXPECT_NEAR(clock.seconds("b1920"), std::log2(1.0 + std::log(2.0)), 1e-12);
+}
+
 TEST(SessionClock, RoundsTheTiesOfAllTimesUp)
 {
     const SessionClock clock = at48k();

@@ -38,12 +38,34 @@ TEST(XmlText, FindsAStartTag)
     EXPECT_EQ(startTagOf({0, text.size()}, text).in(text), "<a x=\">\">");
 }
 
+TEST(XmlText, FindsTheValueOfAnAttribute)
+{
+    const std::string text = "<a note=\" id=7\" xid='8' id = '9' empty=\"\"/>";
+    const TextRange tag{0, text.size()};
+    EXPECT_EQ(valueIn(tag, "id", text)->in(text), "9");
+    EXPECT_EQ(valueIn(tag, "note", text)->in(text), " id=7");
+    EXPECT_EQ(valueIn(tag, "empty", text)->in(text), "");
+    EXPECT_FALSE(valueIn(tag, "other", text));
+}
+
 TEST(XmlText, TellsHowDeepAnElementStands)
 {
     const std::string text = "<a>\n    <b/><c/>\n</a>";
     EXPECT_EQ(depthOf({text.find("<b"), text.find("<c")}, text), 2U);
     EXPECT_EQ(depthOf({text.find("<c"), text.find("\n</a")}, text), 0U);
     EXPECT_EQ(depthOf({0, text.size()}, text), 0U);
+}
+
+TEST(XmlText, ReplacesWhatXmlCannotHold)
+{
+    EXPECT_EQ(withoutForbidden("a\x01"
+                               "b\x0B"
+                               "c\x1F\t\r\n\x7F"),
+              "a\xEF\xBF\xBD"
+              "b\xEF\xBF\xBD"
+              "c\xEF\xBF\xBD\t\r\n\x7F");
+    EXPECT_EQ(withoutForbidden("\xEF\xBF\xBE|\xEF\xBF\xBF|\xEF\xBF\xBD|\xC3\xA4"),
+              "\xEF\xBF\xBD|\xEF\xBF\xBD|\xEF\xBF\xBD|\xC3\xA4");
 }
 
 TEST(TextPatch, LeavesAllElseAsItWas)
