@@ -1306,8 +1306,8 @@ TEST(Apply, AProjectThatCantBeReadIsRefused)
 
     const std::string none = scene.folder / "none.stage";
     EXPECT_EQ(refusal(none), "cadrel: " + none + ": no such file; check the name and the folder\n");
-    EXPECT_EQ(refusal(scene.folder.path()),
-              "cadrel: " + scene.folder.path().string() + ": is a folder without a session; give the project file in it\n");
+    EXPECT_EQ(refusal(scene.folder.path()), "cadrel: " + scene.folder.path().string() +
+                                                ": is a folder without a session; give the project file in it\n");
     EXPECT_TRUE(tells(refusal(scene.oldFile), "take an intact copy, or the version of Cadrel that wrote it\n"));
     const std::string empty = scene.folder.write("empty.stage", projectAt(24, false, false, 3600));
     EXPECT_EQ(refusal(empty),

@@ -33,10 +33,11 @@ struct Palette {
     static constexpr PaletteColour eventTeal = opaque(2, 168, 168);   ///< VFX events, on the timeline and in tables
     static constexpr PaletteColour light = opaque(231, 232, 233);     ///< a pressed button
     static constexpr PaletteColour lightBlue = opaque(163, 204, 255); ///< a button that is on; the highlight of menus
-    static constexpr PaletteColour orange = opaque(255, 173, 0);      ///< the preview button that is on; a video that is missing
-    static constexpr PaletteColour highlight = selection;             ///< text of events related to the selected ones
-    static constexpr PaletteColour sheetShade = {0x3a899593};         ///< what a sheet lays over the whole window
-    static constexpr PaletteColour sheet = {0xff899593};              ///< the panel of a sheet
+    static constexpr PaletteColour orange =
+        opaque(255, 173, 0);                              ///< the preview button that is on; a video that is missing
+    static constexpr PaletteColour highlight = selection; ///< text of events related to the selected ones
+    static constexpr PaletteColour sheetShade = {0x3a899593}; ///< what a sheet lays over the whole window
+    static constexpr PaletteColour sheet = {0xff899593};      ///< the panel of a sheet
 };
 
 } // namespace cadrel::gui

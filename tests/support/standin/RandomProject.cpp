@@ -3,12 +3,12 @@
 #include "tests/support/standin/RandomProject.h"
 
 #include "standin/base/AttributeList.h"
-#include "standin/stage/ProjectKeys.h"
 #include "standin/project/ClipEvent.h"
 #include "standin/project/Envelope.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
 #include "standin/project/Track.h"
+#include "standin/stage/ProjectKeys.h"
 
 #include <rapidcheck.h>
 
