@@ -11,9 +11,9 @@
 #include <pugixml.hpp>
 #include <rapidcheck/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <map>
-#include <ranges>
 #include <set>
 #include <sstream>
 
@@ -203,7 +203,9 @@ RC_GTEST_PROP(ArdourLaw, WhatIsWrittenHoldsTheValuesThatTheProjectHolds, ())
     const std::map<long, double> written = mutesIn(session.text());
 
     // On the track the values lie between the least and the largest of the list.
-    const auto [least, most] = std::ranges::minmax(before | std::views::values);
+    const auto byValue = [](const auto& a, const auto& b) { return a.second < b.second; };
+    const double least = std::ranges::min_element(before, byValue)->second;
+    const double most = std::ranges::max_element(before, byValue)->second;
     const Envelope& expected = *session.project.allTracks().front()->curves().at(Envelope::Curve::Mute);
     for (const Node* point = expected.firstChild(); point; point = expected.childBehind(*point)) {
         for (const long beside : {-1L, 1L}) {
