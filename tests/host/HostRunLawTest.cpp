@@ -14,6 +14,7 @@
 #include "standin/Application.h"
 #include "standin/edit/EditService.h"
 #include "standin/edit/ProjectManager.h"
+#include "standin/base/Times.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/AutomationPoint.h"
 #include "standin/project/ClipEvent.h"
@@ -62,11 +63,25 @@ bool isLevelFrom(const standin::Envelope& curve, double time)
 }
 
 /// What each curve that has points comes to or goes on with at an instant.
+/// The first or the last of the points of a curve that stand at an instant, by its exact time; else the time itself.
+double exactTimeOf(const standin::Envelope& curve, const RandomRun::Side& side)
+{
+    double exact = side.time;
+    for (const standin::Node* point = curve.firstChildFrom(side.time - standin::SameInstant);
+         point && point->start() < side.time + standin::SameInstant; point = curve.childBehind(*point)) {
+        exact = point->start();
+        if (side.isBefore)
+            break;
+    }
+    return exact;
+}
+
 std::map<std::int32_t, double> valuesAt(const standin::Track& track, const RandomRun::Side& side)
 {
     std::map<std::int32_t, double> values;
     for (const auto& [number, curve] : track.curves()) {
-        if (const auto value = side.isBefore ? curve->valueBefore(side.time) : curve->valueBehind(side.time))
+        const double time = exactTimeOf(*curve, side);
+        if (const auto value = side.isBefore ? curve->valueBefore(time) : curve->valueBehind(time))
             values[number] = *value;
     }
     return values;
