@@ -1730,7 +1730,7 @@ public:
         for (std::uint64_t count = chance.below(5); count > 0; --count)
             writeMemo(Place{m_chance.oneIn(4) ? Elsewhere : someStretch(), unusedStart()}, false);
         std::vector<std::shared_ptr<core::EventBase>> events;
-        for (int stretch = 0; stretch < Elsewhere; ++stretch)
+        for (std::size_t stretch = 0; stretch < Elsewhere; ++stretch)
             events.push_back(carried(25 * Sources.at(stretch), 25 * Destinations.at(stretch), StretchLength));
         preview(events);
         for (Memo& memo : m_memos) {

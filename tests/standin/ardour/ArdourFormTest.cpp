@@ -390,7 +390,8 @@ TEST(ArdourForm, SwitchesTheFadesOffWhereTwoPiecesFollow)
     tail->setSpan(6.0, 7.0);
     head->insertInto(track);
     tail->insertInto(track);
-    const auto regions = Parsed(session.text()).all("//Playlist/Region");
+    const Parsed written(session.text());
+    const auto regions = written.all("//Playlist/Region");
     ASSERT_EQ(regions.size(), 2U);
     const auto fadesOf = [](const pugi::xml_node& node) {
         return std::string(node.attribute("fade-in-active").value()) + node.attribute("fade-out-active").value();
@@ -404,7 +405,8 @@ TEST(ArdourForm, WritesAListInSamplesOnceItHasMoved)
     const SessionProject session(SessionText{.route = list("pan-azimuth", "Linear", "b0 0.25 b3840 0.75", "BeatTime")});
     Envelope& curve = session.track("Dia").curve(Envelope::Curve::Pan);
     curve.lastChild()->setSpan(2.0, 2.0);
-    const pugi::xml_node list = Parsed(session.text()).one("//AutomationList");
+    const Parsed written(session.text());
+    const pugi::xml_node list = written.one("//AutomationList");
     EXPECT_STREQ(list.attribute("time-domain").value(), "AudioTime");
     EXPECT_STREQ(list.attribute("state").value(), "Play");
     EXPECT_STREQ(list.child("events").text().get(), "a0 0.25\na564480000 0.75\n");
@@ -447,7 +449,8 @@ TEST(ArdourForm, WritesMarkersThatMovedDoubledAndWent)
     const auto again = range.cutOut(2.0, 3.0);
     again->setSpan(9.0, 10.0);
     again->insertInto(markers);
-    const auto written = Parsed(session.text()).all("//Location");
+    const Parsed parsed(session.text());
+    const auto written = parsed.all("//Location");
     ASSERT_EQ(written.size(), 3U);
     EXPECT_STREQ(written[0].attribute("start").value(), "a2257920000");
     EXPECT_STREQ(written[0].attribute("end").value(), "a2257920000");
@@ -531,7 +534,8 @@ TEST_F(OwnContent, IsWrittenTheSameWhenNothingHasChanged)
 
 TEST_F(OwnContent, StandsAmongTheMarkersOfTheSession)
 {
-    const auto locations = Parsed(session.text()).all("//Location");
+    const Parsed written(session.text());
+    const auto locations = written.all("//Location");
     ASSERT_EQ(locations.size(), 2U);
     EXPECT_STREQ(locations[1].attribute("name").value(), "Insert: new shot");
     EXPECT_STREQ(locations[1].attribute("flags").value(), "IsRangeMarker");
