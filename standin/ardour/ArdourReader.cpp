@@ -17,6 +17,7 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
+#include <cmath>
 #include <cstring>
 #include <optional>
 #include <system_error>
@@ -368,7 +369,6 @@ Counted<Track> ArdourReader::trackOf(SessionId route, Project& project)
 void ArdourReader::readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track)
 {
     ArdourSession::Playlist& read = m_session.playlists[route];
-    read.text = rangeOf(playlist);
     for (const pugi::xml_node& region : playlist.children("Region")) {
         if (std::strcmp(region.attribute("type").value(), "audio") == 0) {
             readRegion(region, track);

@@ -59,7 +59,6 @@ struct ArdourSession {
         std::string name;
     };
     struct Playlist {
-        TextRange text;
         std::vector<SessionId> regions; ///< in the order of the text
     };
 

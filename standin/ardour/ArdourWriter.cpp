@@ -15,6 +15,7 @@
 #include <pugixml.hpp>
 
 #include <algorithm>
+#include <optional>
 #include <set>
 
 namespace standin {
