@@ -4,6 +4,7 @@
 
 #include "standin/video/VideoError.h"
 
+#include <bit>
 #include <cstring>
 #include <utility>
 
@@ -37,9 +38,17 @@ AVPixelFormat withoutRange(AVPixelFormat format)
     }
 }
 
+/// The number in a field of an enumeration. A file can bring one there that the enumeration doesn't have.
+template <typename Enumeration>
+int numberIn(const Enumeration& field)
+{
+    static_assert(sizeof(Enumeration) == sizeof(int));
+    return std::bit_cast<int>(field);
+}
+
 int matrixOf(const AVFrame& picture)
 {
-    switch (picture.colorspace) {
+    switch (numberIn(picture.colorspace)) {
     case AVCOL_SPC_BT709:
         return SWS_CS_ITU709;
     case AVCOL_SPC_BT470BG:
@@ -97,7 +106,7 @@ Picture PictureDrawing::draw(const AVFrame& picture, Ratio pixelAspect, Orientat
     if (!m_scaler)
         throw VideoError(VideoError::Reason::Broken);
     constexpr int One = 1 << 16;
-    const bool isFullRange = picture.color_range == AVCOL_RANGE_JPEG || withoutRange(format) != format;
+    const bool isFullRange = numberIn(picture.color_range) == AVCOL_RANGE_JPEG || withoutRange(format) != format;
     const int* const matrix = sws_getCoefficients(matrixOf(picture));
     sws_setColorspaceDetails(m_scaler.get(), matrix, isFullRange ? 1 : 0, matrix, 1, 0, One, One);
 
