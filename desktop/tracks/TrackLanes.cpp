@@ -107,11 +107,12 @@ void TrackLanes::paint(juce::Graphics& graphics)
 {
     cadrel::gui::guardSystem([&] {
         graphics.fillAll(toColour(TracksPalette::ground));
-        if (Stills* const stills = m_view.stills())
+        const juce::Rectangle<int> clip = graphics.getClipBounds();
+        // A part that is drawn anew says nothing of the stills beside it.
+        if (Stills* const stills = m_view.stills(); stills && clip == getLocalBounds())
             stills->startAsking();
         const RowLayout& rows = m_view.rows();
         const int offset = m_view.rowOffset();
-        const juce::Rectangle<int> clip = graphics.getClipBounds();
         for (std::size_t row = rows.firstBelow(clip.getY() + offset);
              row < rows.count() && rows.top(row) - offset < clip.getBottom(); ++row)
             paintRow(graphics, row, {0, rows.top(row) - offset, getWidth(), rows.heightOf(row)});
@@ -171,15 +172,23 @@ void TrackLanes::paintMarkers(juce::Graphics& graphics, const TrackRow& row, juc
         }
         graphics.setColour(colour);
         graphics.fillRect(columns.first, area.getY() + 2, 1, area.getHeight() - 4);
-        if (room <= MarkerSymbol::Size + 2)
+        const int end = columns.first + room;
+        int left = columns.first + 2;
+        if (left >= 0) {
+            if (end - left < MarkerSymbol::Size)
+                continue;
+            MarkerSymbol::draw(graphics, row.markers, static_cast<float>(left), static_cast<float>(symbolTop));
+            left += MarkerSymbol::Size;
+        } else if (!isRange) {
             continue;
-        MarkerSymbol::draw(graphics, row.markers, static_cast<float>(columns.first + 2), static_cast<float>(symbolTop));
-        const int left = columns.first + MarkerSymbol::Size + 6;
-        const int nameRoom = columns.first + room - NamePad - left;
+        }
+        left = std::max(left, 0) + NamePad;
+        // The name of a range stays in sight for as long as the range does.
+        const int nameEnd = (columns.first < 0 ? std::min(end, columns.end) : end) - NamePad;
         graphics.setColour(toColour(Palette::text));
-        if (nameRoom >= LeastNameWidth)
+        if (nameEnd - left >= LeastNameWidth)
             m_names.draw(graphics, row.lane.item(index).event->name(), static_cast<float>(left),
-                         static_cast<float>(baseline), static_cast<float>(nameRoom));
+                         static_cast<float>(baseline), static_cast<float>(nameEnd - left));
     }
 }
 
@@ -268,6 +277,9 @@ void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event
         const int right = LaneBlocks::columnsOf({end, end}, m_view.scale(), getWidth()).first - 1;
         if (right - left < LeastStill || right <= 0 || left >= getWidth())
             continue;
+        const juce::Graphics::ScopedSaveState state(graphics);
+        if (!graphics.reduceClipRegion(left, area.getY(), right - left, area.getHeight()))
+            continue;
         const double place = event.sourceOffset() + std::max(starts[shot] - span.start, 0.0);
         const auto frame = static_cast<std::uint32_t>(std::max(std::floor((place + standin::SameInstant) * rate), 0.0));
         const int height = static_cast<int>(std::ceil(static_cast<float>(area.getHeight()) * pixelScale));
@@ -275,8 +287,7 @@ void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event
         if (!still.isValid())
             continue;
         const int width = still.getWidth() * area.getHeight() / std::max(still.getHeight(), 1);
-        const juce::Graphics::ScopedSaveState state(graphics);
-        graphics.reduceClipRegion(left, area.getY(), right - left, area.getHeight());
+        graphics.setOpacity(1.0F);
         graphics.drawImage(still, left, area.getY(), width, area.getHeight(), 0, 0, still.getWidth(),
                            still.getHeight());
     }
@@ -284,6 +295,9 @@ void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event
 
 void TrackLanes::paintCurve(juce::Graphics& graphics, const CurvePoints& curve, juce::Rectangle<int> area)
 {
+    // Names stay readable above it.
+    if (area.getHeight() >= NameHeight + LeastBody)
+        area.removeFromTop(NameHeight);
     const float top = static_cast<float>(area.getY() + CurveEdge);
     const float room = static_cast<float>(area.getHeight() - 2 * CurveEdge - 1);
     const auto y = [&](float value) { return top + (1.0F - value) * room; };
