@@ -40,6 +40,16 @@ std::vector<Shot> shotsOf(const EventList& cut, const Framerate& framerate, doub
     return shots;
 }
 
+std::vector<double> startsOf(const std::vector<Shot>& shots)
+{
+    std::vector<double> starts;
+    for (const Shot& shot : shots)
+        starts.push_back(shot.place.start);
+    std::ranges::sort(starts);
+    starts.erase(std::unique(starts.begin(), starts.end()), starts.end());
+    return starts;
+}
+
 double overlapOf(const Span& a, const Span& b)
 {
     return std::min(a.end, b.end) - std::max(a.start, b.start);
@@ -86,10 +96,8 @@ ChangeMap::ChangeMap(const EventList& change, const EventList& oldCut, const Eve
         }
         std::ranges::sort(m_withoutSound, {}, &Span::start);
     }
-    for (const Shot& shot : shotsOf(m_state == State::Carried ? newCut : oldCut, framerate, origin))
-        m_cuts.push_back(shot.place.start);
-    std::ranges::sort(m_cuts);
-    m_cuts.erase(std::unique(m_cuts.begin(), m_cuts.end()), m_cuts.end());
+    m_oldCuts = startsOf(shotsOf(oldCut, framerate, origin));
+    m_newCuts = startsOf(shotsOf(newCut, framerate, origin));
     m_byPresent = SpanIndex(std::move(present));
     m_byFormer = SpanIndex(std::move(former));
 }

@@ -41,9 +41,9 @@ juce::Image FrameStills::still(MediaClip& clip, std::uint32_t frame, int height)
         m_uses.splice(m_uses.begin(), m_uses, found->second.use);
         return found->second.image;
     }
-    if (key != m_atWork && m_thread->canDraw() && height > 0 && frame < clip.getFrameCount()) {
-        std::erase(m_wanted, key);
-        m_wanted.push_front(key);
+    if (key != m_atWork.key && m_thread->canDraw() && height > 0 && frame < clip.getFrameCount()) {
+        std::erase_if(m_wanted, [&key](const Wanted& wanted) { return wanted.key == key; });
+        m_wanted.push_front({key, Counted<MediaClip>::share(&clip)});
         if (m_wanted.size() > MostWanted)
             m_wanted.pop_back();
     }
@@ -58,7 +58,6 @@ bool FrameStills::poll()
     if (hasCome) {
         keep(m_atWork, success ? image : juce::Image());
         m_atWork = {};
-        m_clipAtWork.reset();
     }
     if (!m_atWork.clip)
         startNext();
@@ -69,11 +68,11 @@ void FrameStills::startNext()
 {
     if (m_wanted.empty())
         return;
-    const Key next = m_wanted.front();
+    Wanted next = std::move(m_wanted.front());
     m_wanted.pop_front();
-    m_clipAtWork = Counted<MediaClip>::share(next.clip);
-    if (m_thread->request({next.height * Widest, next.height}, VideoFrame{m_clipAtWork, next.frame}))
-        m_atWork = next;
+    const auto& [clip, frame, height] = next.key;
+    if (m_thread->request({height * Widest, height}, VideoFrame{next.clip, frame}))
+        m_atWork = std::move(next);
 }
 
 std::size_t FrameStills::bytesOf(const juce::Image& image)
@@ -81,11 +80,11 @@ std::size_t FrameStills::bytesOf(const juce::Image& image)
     return static_cast<std::size_t>(image.getWidth()) * static_cast<std::size_t>(image.getHeight()) * BytesPerPixel;
 }
 
-void FrameStills::keep(const Key& key, juce::Image image)
+void FrameStills::keep(const Wanted& wanted, juce::Image image)
 {
-    m_uses.push_front(key);
+    m_uses.push_front(wanted.key);
     m_bytes += bytesOf(image);
-    m_kept.insert_or_assign(key, Kept{m_clipAtWork, std::move(image), m_uses.begin()});
+    m_kept.insert_or_assign(wanted.key, Kept{wanted.clip, std::move(image), m_uses.begin()});
     while (m_bytes > m_capacity && m_uses.size() > 1) {
         const auto last = m_kept.find(m_uses.back());
         m_bytes -= bytesOf(last->second.image);

@@ -50,6 +50,10 @@ private:
 
         auto operator<=>(const Key&) const = default;
     };
+    struct Wanted {
+        Key key;
+        Velmark::Counted<standin::MediaClip> clip;
+    };
     struct Kept {
         Velmark::Counted<standin::MediaClip> clip;
         juce::Image image; ///< null where there is none
@@ -57,17 +61,16 @@ private:
     };
 
     static std::size_t bytesOf(const juce::Image& image);
-    void keep(const Key& key, juce::Image image);
+    void keep(const Wanted& wanted, juce::Image image);
     void startNext();
 
     std::unique_ptr<cadrel::host::ImageProviderThread> m_thread;
     std::size_t m_capacity;
     std::size_t m_bytes = 0;
     std::map<Key, Kept> m_kept;
-    std::list<Key> m_uses;    ///< of what is kept; the last used comes first
-    std::deque<Key> m_wanted; ///< the first comes next
-    Key m_atWork;             ///< without a clip while the thread has nothing to do
-    Velmark::Counted<standin::MediaClip> m_clipAtWork;
+    std::list<Key> m_uses;       ///< of what is kept; the last used comes first
+    std::deque<Wanted> m_wanted; ///< the first comes next
+    Wanted m_atWork;             ///< without a clip while the thread has nothing to do
 };
 
 } // namespace desktop

@@ -135,7 +135,7 @@ void TrackLanes::paintRow(juce::Graphics& graphics, std::size_t row, juce::Recta
         paintMarkers(graphics, shown, area);
         return;
     }
-    if (kind == Track::Kind::Audio)
+    if (kind == Track::Kind::Audio && m_view.stateOf(shown) == ChangeMap::State::Carried)
         paintWithoutSound(graphics, area);
     const Columns all{0, getWidth()};
     paintLane(graphics, shown, shown.lane, all, area);
@@ -196,8 +196,16 @@ void TrackLanes::paintLane(juce::Graphics& graphics, const TrackRow& row, const 
                            juce::Rectangle<int> area)
 {
     const LaneBlocks drawn(lane.spans(), m_view.scale(), shown, getWidth());
-    for (const LaneBlocks::Block& block : drawn.blocks)
+    int end = -LaneBlocks::Beyond;
+    for (const LaneBlocks::Block& block : drawn.blocks) {
+        // A block that lies on another one has an edge.
+        if (block.columns.first < end) {
+            graphics.setColour(toColour(TracksPalette::line));
+            graphics.fillRect(block.columns.first - 1, area.getY(), block.columns.count() + 1, area.getHeight());
+        }
+        end = std::max(end, block.columns.end);
         paintBlock(graphics, row, lane, block, area);
+    }
     const bool isPicture = row.track->kind() == Track::Kind::Video;
     graphics.setColour(toColour(row.track->isLocked() ? TracksPalette::lockedName
                                 : isPicture           ? TracksPalette::pictureName
@@ -211,7 +219,7 @@ void TrackLanes::paintBlock(juce::Graphics& graphics, const TrackRow& row, const
 {
     const Lane::Item& item = lane.item(block.index);
     const SpanIndex::Span& span = lane.spans()[block.index];
-    const bool isMarked = m_view.isShown(span);
+    const bool isMarked = m_view.isShown(row, span);
     const BlockColours colours = coloursOf(*row.track, item.kind, isMarked);
     // Without a gap, a cut between two blocks could hardly be seen.
     area.setHorizontalRange({block.columns.first, block.columns.end - 1});
@@ -233,7 +241,7 @@ void TrackLanes::paintBlock(juce::Graphics& graphics, const TrackRow& row, const
             }
         } else if (row.track->kind() == Track::Kind::Video) {
             if (auto* const clip = dynamic_cast<standin::ClipEvent*>(item.event.get()))
-                paintStills(graphics, *clip, span, area);
+                paintStills(graphics, row, *clip, span, area);
         }
     }
     if (item.kind == Lane::Kind::Part && whole.getWidth() > 4) {
@@ -261,14 +269,14 @@ void TrackLanes::paintBlock(juce::Graphics& graphics, const TrackRow& row, const
                      static_cast<float>(right - left));
 }
 
-void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event, const SpanIndex::Span& span,
-                             juce::Rectangle<int> area)
+void TrackLanes::paintStills(juce::Graphics& graphics, const TrackRow& row, standin::ClipEvent& event,
+                             const SpanIndex::Span& span, juce::Rectangle<int> area)
 {
     Stills* const stills = m_view.stills();
     standin::MediaClip* const clip = event.clip();
     if (!stills || !clip || clip->kind() != standin::MediaClip::Kind::Video)
         return;
-    const auto starts = m_view.shotsIn(span, StillSpacing);
+    const auto starts = m_view.shotsIn(row, span, StillSpacing);
     const float pixelScale = graphics.getInternalContext().getPhysicalPixelScaleFactor();
     const double rate = m_view.clock().framerate().rate;
     for (std::size_t shot = 0; shot < starts.size(); ++shot) {
@@ -295,13 +303,14 @@ void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event
 
 void TrackLanes::paintCurve(juce::Graphics& graphics, const CurvePoints& curve, juce::Rectangle<int> area)
 {
-    // Names stay readable above it.
-    if (area.getHeight() >= NameHeight + LeastBody)
+    // Names stay readable above it; those of low rows, which have no room for both, through it.
+    const bool isLow = area.getHeight() < NameHeight + LeastBody;
+    if (!isLow)
         area.removeFromTop(NameHeight);
     const float top = static_cast<float>(area.getY() + CurveEdge);
     const float room = static_cast<float>(area.getHeight() - 2 * CurveEdge - 1);
     const auto y = [&](float value) { return top + (1.0F - value) * room; };
-    graphics.setColour(colourOf(curve.number).withAlpha(0.85F));
+    graphics.setColour(colourOf(curve.number).withAlpha(isLow ? 0.4F : 0.85F));
 
     const TimeScale& scale = m_view.scale();
     const auto begin = curve.times.begin();
@@ -328,7 +337,7 @@ void TrackLanes::paintGhosts(juce::Graphics& graphics, std::size_t row, juce::Re
 {
     const LaneBlocks drawn(m_view.ghostsOf(row), m_view.scale(), getWidth());
     const Columns seen{0, getWidth()};
-    const juce::Colour line = toColour(Palette::light).withAlpha(0.75F);
+    const juce::Colour line = toColour(Palette::light).withAlpha(0.6F);
     const juce::Colour fill = toColour(Palette::light).withAlpha(0.07F);
     const auto paintGhost = [&](const Columns& columns) {
         graphics.setColour(fill);

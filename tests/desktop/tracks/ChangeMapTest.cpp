@@ -69,7 +69,7 @@ TEST_F(ChangeMapTest, KnowsNothingWithoutEvents)
     EXPECT_FALSE(map.placeOf(0));
     EXPECT_TRUE(map.formerPlaces({0.0, 1.0}).empty());
     EXPECT_TRUE(map.withoutSound().empty());
-    EXPECT_TRUE(map.cuts().empty());
+    EXPECT_TRUE(map.cuts(State::Planned).empty());
 }
 
 TEST_F(ChangeMapTest, FindsTheEventThatHasMovedAClipThere)
@@ -164,12 +164,15 @@ TEST_F(ChangeMapTest, DoesNotCountBlackAsNewPicture)
     expectSpans(map(State::Carried).withoutSound(), {{20.0, 25.0}});
 }
 
-TEST_F(ChangeMapTest, HasTheCutsOfThePictureOnTheTracks)
+TEST_F(ChangeMapTest, HasTheCutsOfBothPictures)
 {
-    const std::vector<double> before = map(State::Planned).cuts();
+    const ChangeMap carried = map(State::Carried);
+    const std::vector<double>& before = carried.cuts(State::Planned);
     ASSERT_EQ(before.size(), 3U);
     EXPECT_NEAR(before[1], 10.0, 1e-9);
-    EXPECT_EQ(map(State::Carried).cuts().size(), 4U);
+    const std::vector<double>& after = carried.cuts(State::Carried);
+    ASSERT_EQ(after.size(), 4U);
+    EXPECT_NEAR(after[3], 25.0, 1e-9);
 }
 
 RC_GTEST_PROP(ChangeMap, BringsEachPieceBackToWhereItsEventTookItFrom, ())

@@ -3,6 +3,7 @@
 #include "desktop/tracks/TracksView.h"
 
 #include "core/edl/EventList.h"
+#include "desktop/tracks/Stills.h"
 #include "desktop/tracks/TimeRuler.h"
 #include "desktop/tracks/TrackHeaders.h"
 #include "standin/edit/EditService.h"
@@ -18,7 +19,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <optional>
+#include <set>
 #include <string>
 #include <utility>
 #include <vector>
@@ -42,6 +45,22 @@ constexpr int Width = 1300;
 constexpr int Height = 640;
 /// Of the view without the names and the bar at the right.
 constexpr int LaneWidth = Width - TrackHeaders::Width - 12;
+
+/// Gives a picture for each frame at once.
+class FakeStills : public desktop::Stills {
+public:
+    juce::Image still(standin::MediaClip&, std::uint32_t frame, int height) override
+    {
+        frames.insert(frame);
+        juce::Image image(juce::Image::RGB, height * 16 / 9, height, false);
+        image.clear(image.getBounds(), juce::Colour(frame % 2 == 0 ? 0xff3f5f4fU : 0xff6f5f3fU));
+        return image;
+    }
+    void startAsking() override {}
+    bool poll() override { return false; }
+
+    std::set<std::uint32_t> frames;
+};
 
 /// A view of an empty project of 25 frames a second, whose clock begins at one hour, in a window with the focus.
 class TracksViewTest : public testing::Test {
@@ -377,6 +396,57 @@ TEST_F(TracksViewTest, TellsTheEventOfACopyInThePreview)
     EXPECT_EQ(clicked, (std::vector<std::size_t>{1, 1}));
 }
 
+TEST_F(TracksViewTest, HasNoGhostsOnALockedTrackWhichNoRunTouches)
+{
+    const auto track = m_host.addTrack(TypeWord::Audio, u"DIA 1");
+    m_host.addClip(track, u"moved", 21.0, 27.0);
+    m_view->projectChanged();
+    m_view->setChange(change(ChangeMap::State::Carried));
+    EXPECT_EQ(m_view->ghostsOf(0).size(), 1U);
+    m_view->toggleLock(0);
+    EXPECT_EQ(m_view->ghostsOf(0).size(), 0U);
+}
+
+TEST_F(TracksViewTest, JoinsTheGhostsOfPiecesThatWereOneClip)
+{
+    const auto track = m_host.addTrack(TypeWord::Audio, u"DIA 1");
+    m_host.addClip(track, u"wind", 20.0, 23.0);
+    m_host.addClip(track, u"wind", 23.0, 25.0);
+    m_host.addClip(track, u"gulls", 25.0, 26.0);
+    m_view->projectChanged();
+    m_view->setChange(change(ChangeMap::State::Carried));
+    const auto& ghosts = m_view->ghostsOf(0);
+    ASSERT_EQ(ghosts.size(), 2U);
+    EXPECT_NEAR(ghosts[0].start, 10.0, 1e-9);
+    EXPECT_NEAR(ghosts[0].end, 15.0, 1e-9);
+    EXPECT_NEAR(ghosts[1].end, 16.0, 1e-9);
+}
+
+TEST_F(TracksViewTest, AsksForAStillAtEachCutThatIsSeen)
+{
+    const auto track = m_host.addTrack(TypeWord::Video, u"VIDEO");
+    m_host.addClip(track, u"reel", 0.0, 30.0);
+    auto& event = static_cast<standin::ClipEvent&>(*m_host.project.allTracks()[0]->firstChild());
+    event.setClip(Velmark::Counted<standin::MediaClip>::share(&m_host.addVideo(u"/reel.mov", 60.0)));
+    event.setSourceOffset(2.0);
+    EventList cut(ListKind::New);
+    cut.add(makeEvent("A", "01:00:00:00", "01:00:12:00", "01:00:00:00", "01:00:12:00"));
+    cut.add(makeEvent("B", "01:00:00:00", "01:00:18:00", "01:00:12:00", "01:00:30:00"));
+    FakeStills stills;
+    TracksView view(m_host.project, m_host.application.edits(), &stills);
+    view.setSize(Width, 200);
+    view.fitAll();
+    view.setChange({EventList(), EventList(), cut, m_rate.framerate, 3600.0, ChangeMap::State::Carried});
+    expectPicture(view, "tracks-stills");
+    // Two seconds into the file, at 25 frames a second.
+    EXPECT_EQ(stills.frames, (std::set<std::uint32_t>{50, 350}));
+
+    stills.frames.clear();
+    view.scrollTo(15.0);
+    view.createComponentSnapshot(view.getLocalBounds());
+    EXPECT_EQ(stills.frames, (std::set<std::uint32_t>{350}));
+}
+
 TEST_F(TracksViewTest, ScrollsToAnEventThatIsOutOfSight)
 {
     const auto track = m_host.addTrack(TypeWord::Audio, u"DIA 1");
@@ -387,7 +457,7 @@ TEST_F(TracksViewTest, ScrollsToAnEventThatIsOutOfSight)
     const auto fitted = m_view->scale();
     m_view->showEvent(1);
     EXPECT_EQ(m_view->scale(), fitted);
-    m_view->zoomBy(2.0);
+    m_view->zoomBy(4.0);
     m_view->scrollTo(-10.0);
     m_view->showEvent(1);
     EXPECT_NEAR(m_view->scale().pixelAt(20.0), 0.2 * LaneWidth, 1e-6);
