@@ -50,6 +50,13 @@ std::vector<double> startsOf(const std::vector<Shot>& shots)
     return starts;
 }
 
+/// Whether the timecodes exist at the rate, which may be another than that of the lists.
+bool hasTimes(const EventBase& event, const Framerate& framerate)
+{
+    return event.srcIn().isValid(framerate) && event.srcOut().isValid(framerate) && event.dstIn().isValid(framerate) &&
+           event.dstOut().isValid(framerate);
+}
+
 double overlapOf(const Span& a, const Span& b)
 {
     return std::min(a.end, b.end) - std::max(a.start, b.start);
@@ -63,7 +70,7 @@ ChangeMap::ChangeMap(const EventList& change, const EventList& oldCut, const Eve
 {
     for (std::size_t index = 0; index < change.size(); ++index) {
         const EventBase& event = change.at(index);
-        if (!event.isValid())
+        if (!event.isValid() || !hasTimes(event, framerate))
             continue;
         const auto span = [&](const auto& in, const auto& out) {
             return Span{in.toSeconds(framerate) - origin, out.toSeconds(framerate) - origin};

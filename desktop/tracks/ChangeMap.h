@@ -22,7 +22,7 @@ public:
     enum class State { Planned, Carried };
 
     ChangeMap() = default;
-    /// The events of the change EDL and of both cuts. Events that aren't valid are left out. `origin` is what the clock of the
+    /// The events of the change EDL and of both cuts. Events that aren't valid, or not at this rate, are left out. `origin` is what the clock of the
     /// project shows at its time 0.
     ChangeMap(const cadrel::core::EventList& change, const cadrel::core::EventList& oldCut,
               const cadrel::core::EventList& newCut, const cadrel::core::Framerate& framerate, double origin,

@@ -152,6 +152,14 @@ TEST_F(ChangeMapTest, LeavesOutEventsThatAreNotValid)
     EXPECT_FALSE(map(State::Carried).placeOf(0));
 }
 
+TEST_F(ChangeMapTest, LeavesOutEventsThatDoNotExistAtTheRate)
+{
+    m_change.add(makeEvent("D", "01:00:30:24", "01:00:31:24", "01:00:40:24", "01:00:41:24"));
+    const ChangeMap map(m_change, m_old, m_new, cadrel::core::Framerate(24, 0), 3600.0, State::Carried);
+    EXPECT_EQ(map.eventOf({12.0, 13.0}, State::Carried), 2U);
+    EXPECT_FALSE(map.placeOf(3));
+}
+
 TEST_F(ChangeMapTest, KnowsTheNewPictureWithoutSound)
 {
     expectSpans(map(State::Carried).withoutSound(), {{20.0, 25.0}});

@@ -11,6 +11,7 @@
 #include "tests/support/TreePaths.h"
 #include "tests/support/core/EventMaking.h"
 #include "tests/support/core/TestProject.h"
+#include "tests/support/standin/RandomProject.h"
 #include "tests/support/standin/TestHost.h"
 #include "tests/support/window/FocusedWindow.h"
 #include "tests/support/window/Pictures.h"
@@ -561,6 +562,29 @@ TEST_F(TracksViewTest, IsDrawnAtEverySizeAndPlace)
             }
         }
         m_view->fitAll();
+    }
+}
+
+TEST_F(TracksViewTest, DrawsWhateverAProjectMayHold)
+{
+    for (std::uint64_t seed = 1; seed <= 40; ++seed) {
+        standin::tests::SeededChance chance(seed);
+        standin::ChangeLog log;
+        const auto project = standin::tests::randomProject(chance, log);
+        FakeStills stills;
+        TracksView view(*project, m_host.application.edits(), &stills);
+        view.setSize(600, 400);
+        view.setChange(change(ChangeMap::State::Carried));
+        view.setGhosts(true);
+        view.showEvent(chance.below(3));
+        for (const RowLayout::Size size : {RowLayout::Size::Small, RowLayout::Size::Large}) {
+            view.setRowSize(size);
+            view.createComponentSnapshot(view.getLocalBounds());
+            for (std::size_t row = 0; row < view.rows().count(); ++row)
+                view.clicked(row, static_cast<int>(chance.below(400)));
+            view.zoomBy(3.0);
+        }
+        EXPECT_EQ(view.rows().count(), project->allTracks().size()) << seed;
     }
 }
 
