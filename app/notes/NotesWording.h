@@ -47,9 +47,10 @@ public:
     /// 35 mm feet and frames, 16 frames a foot: "12+05". The first frame of a reel is 0+00.
     static std::string feet(std::int32_t frames);
 
-    /// The timecode of `placeOf`; of a step that moves its reel where the reel began.
+    /// The timecode of `placeOf`.
     std::string timeOf(const core::NoteEntry& entry, std::size_t reel) const;
-    /// Where a row stands in the programme as it is then. Of a move to further on it is where the picture is taken from.
+    /// Where a row stands in the programme as it is then. Of a move to further on it is where the picture is taken from, and
+    /// of a reel that is moved as a whole where it began until then.
     core::WorkPlace placeOf(const core::NoteEntry& entry, std::size_t reel) const;
     /// "delete 00:00:01:00"; at the other end of a move "moved 00:00:30:00 to reel 8, step 40".
     std::string action(const core::NoteEntry& entry) const;
@@ -100,7 +101,9 @@ private:
     std::string speedText(const core::EventBase& was, const core::EventBase& now) const;
     std::string ownSpeedText(const core::EventBase* shot) const;
     std::string formerVersion(const core::PictureChange& change) const;
+    std::string wholeReel(const core::NoteStep& step) const;
     bool hasSteps() const;
+    bool movesReels() const;
     /// The name of a file; with its cut where both have a file of that name.
     std::string fileOf(const std::string& file, bool isNew) const;
     void addDoubts(bool isNew, std::vector<std::string>& lines) const;
