@@ -609,6 +609,40 @@ std::string NotesWording::titles() const
     return concatenated({cutTitle(false), " to ", cutTitle(true)});
 }
 
+std::string NotesWording::bothCuts() const
+{
+    const std::string was = cutTitle(false);
+    const std::string is = cutTitle(true);
+    if (was != is)
+        return concatenated({was, " to ", is});
+    return toPrintable(concatenated({cutName(false), " to ", cutName(true)})).text;
+}
+
+std::string NotesWording::nothingHasChanged() const
+{
+    return passedOver(false) == passedOver(true) ? "Nothing has changed."
+                                                 : "Nothing has changed in what could be read; see below.";
+}
+
+/// The lines of a cut that have no picture or no place that can be read, and those that were not read.
+std::multiset<std::string> NotesWording::passedOver(bool isNew) const
+{
+    std::multiset<std::string> lines;
+    const core::Programme& cut = isNew ? m_document.notes.newCut() : m_document.notes.oldCut();
+    for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
+        if (doubtful.doubt != PictureDoubt::NoPicture)
+            continue;
+        const EventBase& event = cut.events().at(static_cast<std::size_t>(doubtful.event));
+        lines.insert(concatenated({event.rollName(), "\n", event.clipName(), "\n", event.srcIn().toString(),
+                                   event.srcOut().toString(), event.dstIn().toString(), event.dstOut().toString()}));
+    }
+    for (const auto& [file, unreadLines] : isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread) {
+        for (const auto& [line, problem] : unreadLines)
+            lines.insert(line.text);
+    }
+    return lines;
+}
+
 bool NotesWording::movesReels() const
 {
     const auto movesReel = [](const NoteEntry& entry) {

@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <initializer_list>
+#include <set>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -72,12 +73,16 @@ public:
     std::string cutTitle(bool isNew) const;
     /// "REEL 3 V07 to REEL 3 V12"; empty where no file has a title.
     std::string titles() const;
+    /// "REEL 3 V07 to REEL 3 V12", or the names of the files where the titles don't tell the cuts apart.
+    std::string bothCuts() const;
     /// The names of the files of a cut; of many the first and the last.
     std::string cutName(bool isNew) const;
     /// How many steps a reel has.
     std::size_t stepsOf(std::size_t reel) const;
     /// The shot of the largest change of a step, and how many more shots it changes: "42A-3 MAREN MCU and 2 more".
     std::string shotsOf(const core::NoteEntry& entry) const;
+    /// Where there are no steps. Also whether anything was passed over in one of the cuts alone.
+    std::string nothingHasChanged() const;
     /// How the steps and the lines below them are meant; empty where nothing needs to be explained.
     std::string order() const;
     /// The settings in force, a line for each place that they are from: "Settings given: --simplify 12".
@@ -102,6 +107,7 @@ private:
     std::string ownSpeedText(const core::EventBase* shot) const;
     std::string formerVersion(const core::PictureChange& change) const;
     std::string wholeReel(const core::NoteStep& step) const;
+    std::multiset<std::string> passedOver(bool isNew) const;
     bool hasSteps() const;
     bool movesReels() const;
     /// The name of a file; with its cut where both have a file of that name.

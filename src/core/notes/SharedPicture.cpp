@@ -24,15 +24,15 @@ constexpr std::size_t FramesOfAWord = 64;
 /// more than the programme, so that the starts or the ends of the events decide, whichever fit better.
 std::int64_t shiftBetween(const ShownRun& oldRun, const ShownRun& newRun)
 {
+    const double speed = (oldRun.eventLength < newRun.eventLength ? newRun : oldRun).sourceStep;
     const auto startOf = [](const ShownRun& run) { return run.source - run.eventFrame * run.sourceStep; };
     const auto endOf = [&](const ShownRun& run) { return startOf(run) + run.eventLength * run.sourceStep; };
     const double atStart = startOf(newRun) - startOf(oldRun);
     const double atEnd = endOf(newRun) - endOf(oldRun);
     constexpr double SameFrame = 1e-6;
-    const std::int64_t ofEvents =
-        std::abs(atEnd) < std::abs(atStart) - SameFrame
-            ? oldRun.eventLength - newRun.eventLength + std::llround(atEnd / oldRun.sourceStep)
-            : std::llround(atStart / oldRun.sourceStep);
+    const std::int64_t ofEvents = std::abs(atEnd) < std::abs(atStart) - SameFrame
+                                      ? oldRun.eventLength - newRun.eventLength + std::llround(atEnd / speed)
+                                      : std::llround(atStart / speed);
     return ofEvents + newRun.eventFrame - oldRun.eventFrame;
 }
 

@@ -266,7 +266,15 @@ std::string PrintedNotes::cutLine(const char* side) const
 
 std::string PrintedNotes::cuts() const
 {
-    return cutName("old") + " to " + cutName("new");
+    const auto titleOf = [this](const char* side) {
+        const json& titles = m_notes.at(side).at("titles");
+        if (titles.empty())
+            return cutName(side);
+        const std::string first = titles.front();
+        return titles.size() == 1 ? first : first + " ... " + titles.back().get<std::string>();
+    };
+    const bool areApart = titleOf("old") != titleOf("new");
+    return (areApart ? titleOf("old") : cutName("old")) + " to " + (areApart ? titleOf("new") : cutName("new"));
 }
 
 std::string PrintedNotes::headBeforeSettings(Form form) const

@@ -61,11 +61,11 @@ SeenFrame frameOf(const EventList& events, std::size_t index, const EventBase* b
     const double speed = isStill || event.isNormalSpeed() ? 1.0 : event.motionSpeed();
     const int length = event.dstOut().toFrameCount(rules.framerate) - event.dstIn().toFrameCount(rules.framerate);
     if (event.isTransition() && frame < event.transitionDuration())
-        return {transitionText(events, index, before, rules) + (isStill ? " frozen" : ""), frame * speed, speed,
-                length};
+        return {transitionText(events, index, before, rules) + (isStill ? " frozen" : ""), frame * speed, speed, length,
+                frame};
     if (isStill)
         return {name + " frozen at " + event.srcIn().toString(), static_cast<double>(frame)};
-    return {name, event.srcIn().toFrameCount(rules.framerate) + frame * speed, speed, length};
+    return {name, event.srcIn().toFrameCount(rules.framerate) + frame * speed, speed, length, frame};
 }
 
 } // namespace
@@ -78,10 +78,14 @@ bool SeenFrame::looksLike(const SeenFrame& other) const
         return source == other.source;
     constexpr double LongestShot = 2000;
     const double apart = std::abs(speed - other.speed);
-    const double distance = std::abs(source - other.source);
     if (apart < 0.01)
-        return distance <= std::abs(speed) + apart * LongestShot;
-    return apart * std::min(shotLength, other.shotLength) < 1.0 - 1e-6 && distance <= std::abs(speed) + 1.0;
+        return std::abs(source - other.source) <= std::abs(speed) + apart * LongestShot;
+    const double common = shotLength < other.shotLength ? other.speed : speed;
+    const auto sourceAt = [common](const SeenFrame& frame) {
+        return frame.source + frame.shotFrame * (common - frame.speed);
+    };
+    return apart * std::min(shotLength, other.shotLength) < 1.0 - 1e-6 &&
+           std::abs(sourceAt(*this) - sourceAt(other)) <= common + 1.0;
 }
 
 std::vector<SeenReel> framesOf(const EventList& events, const PictureRules& rules)

@@ -18,9 +18,11 @@ struct SeenFrame {
     double source = 0.0; ///< the frame of the material
     double speed = 1.0;
     int shotLength = 0; ///< frames of its event
+    int shotFrame = 0;  ///< which of them it is
 
     /// Retimed shots may lie a frame apart, and what two speeds that count as one make over the length of a shot. Speeds count
-    /// as one, too, where the source of the shorter shot is less than a frame off at the speed of the longer one.
+    /// as one, too, where the source of the shorter shot is less than a frame off at the speed of the longer one; both run at
+    /// that then.
     bool looksLike(const SeenFrame& other) const;
 };
 
