@@ -30,14 +30,21 @@ const std::string Mpeg2 = "-c:v mpeg2video -b:v 3M -g 15 -bf 2 ";
 const std::string ProRes = "-c:v prores_ks -profile:v 0 ";
 const std::string Film = "24000/1001";
 const std::string Television = "30000/1001";
+const std::string FastTelevision = "60000/1001";
 
 std::vector<VideoRecipe> recipes()
 {
     std::vector<VideoRecipe> all;
-    for (const std::string& rate : {Film, Television}) {
-        const std::string label = rate == Film ? "film" : "television";
-        // The timecode of the file counts drop-frame at 29.97.
-        const std::string timecode = rate == Film ? "-timecode 01:00:59:12 " : "-timecode '01:00:59;20' ";
+    struct Kind {
+        std::string rate;
+        std::string label;
+        std::string timecode;
+    };
+    // The timecode of the file counts drop-frame at 29.97 and 59.94.
+    for (const auto& [rate, label, start] :
+         {Kind{Film, "film", "01:00:59:12"}, Kind{Television, "television", "01:00:59;20"},
+          Kind{FastTelevision, "fast-television", "01:00:59;50"}}) {
+        const std::string timecode = "-timecode '" + start + "' ";
         all.push_back({label + ".mp4", 300, rate, OpenGroups + timecode});
         all.push_back({label + ".mov", 300, rate, OpenGroups + timecode});
         all.push_back({label + ".ts", 300, rate, OpenGroups});
@@ -51,7 +58,7 @@ std::vector<VideoRecipe> recipes()
 
 double rateOf(const VideoRecipe& recipe)
 {
-    return recipe.rate == Film ? 23.976 : 29.97;
+    return recipe.rate == Film ? 23.976 : recipe.rate == Television ? 29.97 : 59.94;
 }
 
 /// The number in the picture of a frame, or why there is none.
