@@ -26,12 +26,12 @@ using Velmark::Counted;
 namespace {
 
 template <class Error = ProjectFileError>
-[[noreturn]] void fail(std::string name, const std::string& fault)
+[[noreturn]] void fail(std::string name, const std::string& fault, const std::string& remedy = {})
 {
     // A name may hold anything, but the message is one line.
     std::ranges::replace_if(
         name, [](char byte) { return (byte >= 0 && byte < 0x20) || byte == 0x7F; }, '?');
-    throw Error(name + ": " + fault);
+    throw Error(name + ": " + fault, remedy);
 }
 
 std::string contentOf(const fs::path& file)
@@ -89,7 +89,7 @@ fs::path ProjectFile::fileIn(const fs::path& path)
         if (entry->path().extension() != ArdourForm::Extension)
             continue;
         if (!found.empty())
-            fail(path.string(), "holds several sessions; name one of them");
+            fail(path.string(), "holds several sessions", "name one of them");
         found = entry->path();
     }
     if (error)
@@ -108,7 +108,7 @@ Counted<Project> ProjectFile::read(const fs::path& file, ChangeLog& log)
             project->form()->requireFree(file);
         return project;
     } catch (const FileFault& fault) {
-        fail(file.string(), fault.what());
+        fail(file.string(), fault.what(), fault.remedy());
     }
 }
 
@@ -117,7 +117,7 @@ Counted<Project> ProjectFile::parse(std::string_view text, const std::string& na
     try {
         return parsed(std::string(text), name, log);
     } catch (const FileFault& fault) {
-        fail(name, fault.what());
+        fail(name, fault.what(), fault.remedy());
     }
 }
 
@@ -129,7 +129,7 @@ void ProjectFile::requireWritable(const Project& project, const fs::path& file)
         project.form()->requirePlace(file);
         project.form()->requireFree(file);
     } catch (const FileFault& fault) {
-        fail(file.string(), fault.what());
+        fail(file.string(), fault.what(), fault.remedy());
     }
 }
 
@@ -145,7 +145,7 @@ void ProjectFile::write(const Project& project, const fs::path& file, const std:
         if (form)
             form->wasWritten(file);
     } catch (const FileFault& fault) {
-        fail(file.string(), std::string("this project can't be stored: ") + fault.what());
+        fail(file.string(), std::string("this project can't be stored: ") + fault.what(), fault.remedy());
     } catch (const FileReplacement::TargetChanged&) {
         fail<ProjectFileChanged>(file.string(), "another program has written it meanwhile");
     } catch (const cadrel::util::Result::Type&) {
