@@ -132,8 +132,8 @@ public:
             const std::int64_t dip = edge != RegionEdge::New ? 0 : isKept ? markedDip(mark) : edgeFade;
             return std::min(dip, m_length / 2);
         };
-        m_headDip = dipOf(piece.head, piece.keepsHead(region.m_region), region.m_region.head);
-        m_tailDip = dipOf(piece.tail, piece.keepsTail(region.m_region), region.m_region.tail);
+        m_headDip = dipOf(piece.head, piece.keepsHead(), region.m_region.head);
+        m_tailDip = dipOf(piece.tail, piece.keepsTail(), region.m_region.tail);
         m_in = std::max({m_inEnd, m_headDip, std::int64_t{0}});
         m_out = std::min({m_outBegin, m_length - m_tailDip, m_length});
         if (m_in > m_out)
@@ -323,8 +323,8 @@ void RegionFades::cut(pugi::xml_node& element, const RegionPiece& piece, std::in
                       const std::function<SessionId()>& newId) const
 {
     const Piece fades(*this, piece, edgeFade);
-    fades.writeIn(element, piece.keepsHead(m_region), newId);
-    fades.writeOut(element, piece.keepsTail(m_region), newId);
+    fades.writeIn(element, piece.keepsHead(), newId);
+    fades.writeOut(element, piece.keepsTail(), newId);
     const auto note = [&](const char* end, RegionEdge edge, std::int64_t dip, std::int64_t place, std::int64_t length) {
         if (edge == RegionEdge::Old)
             CutMark::remove(element, end);

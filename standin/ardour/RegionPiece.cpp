@@ -60,18 +60,44 @@ void cutEnvelope(pugi::xml_node& element, const ArdourSession::Region& region, c
     writePoints(list, cut, clock);
 }
 
+/// What a region was before the run.
+RegionPiece formerOf(const ArdourSession::Region& region)
+{
+    return {region.position, region.length, region.start, region.head ? RegionEdge::New : RegionEdge::Old,
+            region.tail ? RegionEdge::New : RegionEdge::Old};
+}
+
+struct SourcePiece {
+    SessionId source;
+    RegionPiece* piece;
+};
+
+void findSeams(const std::vector<SourcePiece>& pieces)
+{
+    // Where pieces begin and end: the source, and the places in the programme and in the source.
+    using Instant = std::tuple<SessionId, std::int64_t, std::int64_t>;
+    const auto headOf = [](const SourcePiece& of) { return Instant{of.source, of.piece->position, of.piece->start}; };
+    const auto tailOf = [](const SourcePiece& of) {
+        const std::int64_t length = of.piece->length;
+        return Instant{of.source, of.piece->position + length, of.piece->start + length};
+    };
+    std::set<Instant> heads;
+    std::set<Instant> tails;
+    for (const SourcePiece& of : pieces) {
+        if (of.piece->head == RegionEdge::New)
+            heads.insert(headOf(of));
+        if (of.piece->tail == RegionEdge::New)
+            tails.insert(tailOf(of));
+    }
+    for (const SourcePiece& of : pieces) {
+        if (of.piece->head == RegionEdge::New && tails.contains(headOf(of)))
+            of.piece->head = RegionEdge::Seam;
+        if (of.piece->tail == RegionEdge::New && heads.contains(tailOf(of)))
+            of.piece->tail = RegionEdge::Seam;
+    }
+}
+
 } // namespace
-
-bool RegionPiece::keepsHead(const ArdourSession::Region& region) const
-{
-    return head == RegionEdge::Old || (start == region.start && region.head && region.head->edge == head);
-}
-
-bool RegionPiece::keepsTail(const ArdourSession::Region& region) const
-{
-    return tail == RegionEdge::Old ||
-           (start + length == region.start + region.length && region.tail && region.tail->edge == tail);
-}
 
 std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std::vector<const ClipEvent*>& events,
                                   const SessionClock& clock)
@@ -97,30 +123,24 @@ std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std
 
 void findSeams(std::vector<RegionPieces>& playlist)
 {
-    // Where pieces begin and end: the source, and the places in the programme and in the source.
-    using Instant = std::tuple<SessionId, std::int64_t, std::int64_t>;
-    const auto headOf = [](const RegionPieces& of, const RegionPiece& piece) {
-        return Instant{of.region.source, piece.position, piece.start};
-    };
-    const auto tailOf = [](const RegionPieces& of, const RegionPiece& piece) {
-        return Instant{of.region.source, piece.position + piece.length, piece.start + piece.length};
-    };
-    std::set<Instant> heads;
-    std::set<Instant> tails;
-    for (const RegionPieces& of : playlist) {
-        for (const RegionPiece& piece : of.pieces) {
-            if (piece.head == RegionEdge::New)
-                heads.insert(headOf(of, piece));
-            if (piece.tail == RegionEdge::New)
-                tails.insert(tailOf(of, piece));
-        }
-    }
+    std::vector<RegionPiece> former;
+    std::vector<SourcePiece> formerPlaces;
+    former.reserve(playlist.size());
+    std::vector<SourcePiece> places;
     for (RegionPieces& of : playlist) {
-        for (RegionPiece& piece : of.pieces) {
-            if (piece.head == RegionEdge::New && tails.contains(headOf(of, piece)))
-                piece.head = RegionEdge::Seam;
-            if (piece.tail == RegionEdge::New && heads.contains(tailOf(of, piece)))
-                piece.tail = RegionEdge::Seam;
+        former.push_back(formerOf(of.region));
+        formerPlaces.push_back({of.region.source, &former.back()});
+        for (RegionPiece& piece : of.pieces)
+            places.push_back({of.region.source, &piece});
+    }
+    findSeams(formerPlaces);
+    findSeams(places);
+    for (std::size_t index = 0; index < playlist.size(); ++index) {
+        const RegionPiece& before = former[index];
+        for (RegionPiece& piece : playlist[index].pieces) {
+            piece.isHeadAsBefore = piece.start == before.start && piece.head == before.head;
+            piece.isTailAsBefore =
+                piece.start + piece.length == before.start + before.length && piece.tail == before.tail;
         }
     }
 }
@@ -157,7 +177,7 @@ void cutRegion(pugi::xml_node& element, const ArdourSession::Region& region, con
     }
     if (element.attribute("whole-file"))
         set(element, "whole-file", "0");
-    if (!piece.keepsHead(region) || !piece.keepsTail(region))
+    if (!piece.keepsHead() || !piece.keepsTail())
         RegionFades(element, region, clock).cut(element, piece, edgeFade, newId);
     cutEnvelope(element, region, piece, clock);
 }

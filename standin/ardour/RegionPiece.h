@@ -25,13 +25,17 @@ struct RegionPiece {
     RegionEdge head = RegionEdge::Old;
     RegionEdge tail = RegionEdge::Old;
 
+    /// Whether an edge that an earlier run has cut is of the kind that it was before this one.
+    bool isHeadAsBefore = false;
+    bool isTailAsBefore = false;
+
     /// Whether an edge is one of the region, and is as it was.
-    bool keepsHead(const ArdourSession::Region& region) const;
-    bool keepsTail(const ArdourSession::Region& region) const;
+    bool keepsHead() const { return head == RegionEdge::Old || isHeadAsBefore; }
+    bool keepsTail() const { return tail == RegionEdge::Old || isTailAsBefore; }
     bool isAll(const ArdourSession::Region& region) const
     {
-        return position == region.position && length == region.length && start == region.start && keepsHead(region) &&
-               keepsTail(region);
+        return position == region.position && length == region.length && start == region.start && keepsHead() &&
+               keepsTail();
     }
 };
 
@@ -46,7 +50,8 @@ struct RegionPieces {
 std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std::vector<const ClipEvent*>& events,
                                   const SessionClock& clock);
 
-/// Makes seams of the new edges of a playlist where a piece goes on in another that was cut from it, in this run or before.
+/// Makes seams of the new edges of a playlist where a piece goes on in another that was cut from it, in this run or before,
+/// and finds which edges are as they were.
 void findSeams(std::vector<RegionPieces>& playlist);
 
 /// Gives the lists in the element of a region other ids.

@@ -58,6 +58,16 @@ std::string contentOf(const fs::path& file)
     return content;
 }
 
+/// Whether a name is one under which Cadrel keeps what it replaces: "reel_backup_1".
+bool isBackup(const fs::path& stem)
+{
+    constexpr std::string_view Mark = "_backup_";
+    const std::string& name = stem.native();
+    const std::size_t mark = name.rfind(Mark);
+    return mark != std::string::npos && mark + Mark.size() < name.size() &&
+           name.find_first_not_of("0123456789", mark + Mark.size()) == std::string::npos;
+}
+
 Counted<Project> parsed(std::string text, const fs::path& file, ChangeLog& log)
 {
     if (ArdourForm::recognises(text))
@@ -86,7 +96,7 @@ fs::path ProjectFile::fileIn(const fs::path& path)
     fs::path found;
     for (fs::directory_iterator entry(path, error); !error && entry != fs::directory_iterator();
          entry.increment(error)) {
-        if (entry->path().extension() != ArdourForm::Extension)
+        if (entry->path().extension() != ArdourForm::Extension || isBackup(entry->path().stem()))
             continue;
         if (!found.empty())
             fail(path.string(), "holds several sessions", "name one of them");

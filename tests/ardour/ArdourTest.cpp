@@ -391,6 +391,8 @@ void makeVersion6000(const std::filesystem::path& file)
     pugi::xml_node session = document.document_element();
     const auto plain = [](const std::string& time) { return std::to_string(std::stoll(time.substr(1)) / 5880); };
     session.attribute("version") = "6000";
+    for (pugi::xml_node route : session.child("Routes").children("Route"))
+        route.attribute("version") = "6000";
     for (const pugi::xpath_node& found : document.select_nodes("//Region")) {
         pugi::xml_node region = found.node();
         const std::string length = region.attribute("length").value();

@@ -830,6 +830,9 @@ TEST_F(SessionFolder, StandsForItsOnlySession)
     EXPECT_EQ(ProjectFile::fileIn(folder / "missing.ardour"), folder / "missing.ardour");
     put("reel.ardour.bak", "<Session/>");
     EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
+    put("reel_backup_1.ardour", "<Session/>");
+    put("reel_backup_12.ardour", "<Session/>");
+    EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
     put("other.ardour", "<Session/>");
     EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);
     // Of several the one counts that is named as the folder is, as Ardour names it at first.

@@ -112,18 +112,25 @@ TEST(RegionPiece, HasASeamWhereAnotherRegionFollowsThatWasCutFromTheSame)
     EXPECT_EQ(edgesOf(other), std::pair(New, Old));
 }
 
-TEST(RegionPiece, KeepsAnEdgeThatIsAsAnEarlierRunLeftIt)
+TEST(RegionPiece, KeepsAnEdgeThatIsAsItWasBeforeTheRun)
 {
-    const auto isLeft = [](RegionEdge former, RegionEdge now) {
-        const ArdourSession::Region region{{}, 1000, 3000, 500, 11, CutMark{former, 64}, {}};
-        RegionPieces of = left(region);
-        of.pieces.at(0).head = now;
-        return of.pieces.at(0).isAll(region);
+    constexpr CutMark Cut{RegionEdge::New, 64};
+    const ArdourSession::Region first{{}, 1000, 3000, 500, 11, {}, Cut};
+    const ArdourSession::Region second{{}, 4000, 7000, 3500, 11, Cut, {}};
+    const auto isAll = [&](std::int64_t moved) {
+        std::vector<RegionPieces> playlist{left(first), left(second)};
+        playlist[1].pieces.at(0).position += moved;
+        findSeams(playlist);
+        return std::pair(playlist[0].pieces.at(0).isAll(first), playlist[1].pieces.at(0).keepsHead());
     };
-    EXPECT_TRUE(isLeft(RegionEdge::New, RegionEdge::New));
-    EXPECT_TRUE(isLeft(RegionEdge::Seam, RegionEdge::Seam));
-    EXPECT_FALSE(isLeft(RegionEdge::New, RegionEdge::Seam));
-    EXPECT_FALSE(isLeft(RegionEdge::Seam, RegionEdge::New));
+    // The user himself may have put them together, with the fades that they have.
+    EXPECT_EQ(isAll(0), std::pair(true, true));
+    EXPECT_EQ(isAll(1), std::pair(false, false));
+
+    // The user may have taken the other piece away.
+    std::vector<RegionPieces> alone{left(second)};
+    findSeams(alone);
+    EXPECT_TRUE(alone[0].pieces.at(0).isAll(second));
 }
 
 TEST(RegionPiece, IsNoneWhenItPlaysNotASample)
@@ -345,8 +352,8 @@ TEST_F(CutRegion, LosesTheShortFadesOfACutWhereItsPiecesMeetAgain)
     ASSERT_TRUE(region.head && region.tail);
     pugi::xml_document document;
     pugi::xml_node element = document.append_copy(cutOnce);
-    cutRegion(element, region, {3000, 5000, 2500, RegionEdge::Seam, RegionEdge::New}, clockAt("48000"), 480,
-              [] { return 1; });
+    cutRegion(element, region, {3000, 5000, 2500, RegionEdge::Seam, RegionEdge::New, false, true}, clockAt("48000"),
+              480, [] { return 1; });
     EXPECT_STREQ(element.attribute("fade-in-active").value(), "0");
     // The other end is as the first run left it.
     EXPECT_STREQ(element.attribute("fade-out-active").value(), "1");
@@ -382,7 +389,7 @@ TEST_F(CutRegion, GetsAShortFadeWhereASeamIsPulledApart)
     ASSERT_TRUE(region.head && region.tail);
     pugi::xml_document document;
     pugi::xml_node element = document.append_copy(cutOnce);
-    cutRegion(element, region, {3000, 5000, 2500, RegionEdge::New, RegionEdge::Seam}, clockAt("48000"), 64,
+    cutRegion(element, region, {3000, 5000, 2500, RegionEdge::New, RegionEdge::Seam, false, true}, clockAt("48000"), 64,
               [] { return 1; });
     EXPECT_STREQ(element.attribute("fade-in-active").value(), "1");
     EXPECT_STREQ(element.attribute("fade-out-active").value(), "0");
