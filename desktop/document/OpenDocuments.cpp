@@ -83,10 +83,10 @@ OpenDocument& OpenDocuments::open(const fs::path& path, Work work)
     const fs::path file = projectAt(path);
     if (OpenDocument* const present = find(file)) {
         activate(*present);
-        return *present;
+    } else {
+        m_documents.push_back(openedFrom(file, work));
+        m_active = m_documents.back().get();
     }
-    m_documents.push_back(openedFrom(file, work));
-    m_active = m_documents.back().get();
     if (m_recent)
         m_recent->add(file);
     return *m_active;
