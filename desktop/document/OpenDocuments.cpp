@@ -102,10 +102,11 @@ std::unique_ptr<OpenDocument> OpenDocuments::openedFrom(const fs::path& path, Wo
     const bool isWork = kept && ContentPrint::of(kept->content) != file.print();
     if (isWork && work == Work::Recover)
         return newDocument(openProject(path, &kept->content), std::move(file), std::move(lock), true);
+    // First, as the work is all that there is where the file can't be opened.
+    standin::Project& project = openProject(path, nullptr);
     if (isWork && work == Work::Keep)
         Autosave::keepAside(path);
-    standin::Project& project = openProject(path, nullptr);
-    if (kept)
+    else if (kept)
         Autosave::remove(path);
     return newDocument(project, std::move(file), std::move(lock), false);
 }

@@ -421,6 +421,46 @@ TEST_F(AutosaveTest, IsOfferedAgainOnceTheOtherProcessHasEndedInWhateverWay)
     EXPECT_FALSE(fs::exists(DocumentLock::pathFor(file)));
 }
 
+TEST_F(AutosaveTest, IsWrittenOnceTheOtherProcessHasClosedTheProjectAndReplacesNothingOfIt)
+{
+    const std::string left = crash();
+    auto lock = std::make_unique<DocumentLock>(file);
+    OpenDocument& document = opened();
+    renameTrack(document, u"B");
+    idle();
+    EXPECT_EQ(contentOf(autosave), left);
+
+    lock.reset();
+    idle();
+
+    EXPECT_FALSE(document.openElsewhere());
+    EXPECT_EQ(contentOf(folder / "reel3.stage.autosave-1"), left);
+    EXPECT_EQ(Autosave::read(file)->content, bytesOf(document));
+}
+
+TEST_F(AutosaveTest, OfAFileThatIsSavedOverIsKept)
+{
+    const std::string left = crash();
+    OpenDocument& other = documents.open(writeProject("reel4.stage"));
+    ASSERT_TRUE(documents.saveAs(other, file).isSaved());
+    renameTrack(other, u"B");
+    idle();
+
+    EXPECT_EQ(contentOf(folder / "reel3.stage.autosave-1"), left);
+    EXPECT_EQ(Autosave::read(file)->content, bytesOf(other));
+}
+
+TEST_F(AutosaveTest, OfAFileThatCannotBeOpenedIsStillOffered)
+{
+    crash(u"FX 1");
+    writeFile(file, "{ broken");
+
+    EXPECT_THROW(opened(Work::Keep), DocumentError);
+    EXPECT_THROW(opened(Work::Remove), DocumentError);
+    ASSERT_TRUE(documents.look(file).unsavedWork);
+    EXPECT_EQ(trackOf(opened(Work::Recover)).name(), u"FX 1");
+}
+
 TEST_F(AutosaveTest, RefusesToSaveAsAFileThatIsOpenInAnotherWindow)
 {
     const fs::path other = fs::canonical(writeProject("reel4.stage"));
