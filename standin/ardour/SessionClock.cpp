@@ -141,15 +141,15 @@ std::int64_t SessionClock::samples(std::string_view time) const
     return samplesAt(seconds(time));
 }
 
-std::int64_t SessionClock::endInSamples(std::string_view time, std::string_view length) const
+std::int64_t SessionClock::lengthInSamples(std::string_view time, std::string_view length) const
 {
     if (!isMusical(length))
-        return samples(time) + samples(length);
+        return samples(length);
     const double start = seconds(time);
     const double end = secondsAtTicks(ticksAt(start) + ticksAt(seconds(length)));
     if (!(end >= start && end <= FurthestTime))
         refuseTime(length);
-    return samplesAt(end);
+    return samplesAt(end - start);
 }
 
 std::int64_t SessionClock::samplesAt(double seconds) const

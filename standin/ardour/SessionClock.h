@@ -36,8 +36,9 @@ public:
     double seconds(std::string_view time) const;
     /// The same, down to the sample as Ardour plays it.
     std::int64_t samples(std::string_view time) const;
-    /// Where what begins at a time ends, when the length may be in other units than the time.
-    std::int64_t endInSamples(std::string_view time, std::string_view length) const;
+    /// How long what begins at a time is, when the length may be in other units than the time; down to the sample as Ardour
+    /// plays it.
+    std::int64_t lengthInSamples(std::string_view time, std::string_view length) const;
     double secondsOf(std::int64_t samples) const
     {
         return static_cast<double>(samples) / static_cast<double>(m_sampleRate);
