@@ -112,13 +112,7 @@ constexpr std::uint32_t BytesVersion = 0x52550001;
 void PastRuns::add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
                    const FrameRange& allowed)
 {
-    addStored(asStored(oldCut), asStored(newCut), asStored(changes), allowed);
-}
-
-void PastRuns::addStored(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                         const FrameRange& allowed)
-{
-    Run run = runOf(oldCut, newCut, changes, allowed);
+    Run run = runOf(asStored(oldCut), asStored(newCut), asStored(changes), allowed);
     if (!run.isOfCuts() && run.changes.isEmpty())
         return;
     forgetWithin(run.extent);
@@ -130,22 +124,20 @@ void PastRuns::forgetWithin(const FrameRanges& extent)
     std::erase_if(m_runs, [&extent](const Run& run) { return without(run.left, extent).empty(); });
 }
 
-PastRuns::Run PastRuns::runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                              const FrameRange& allowed) const
+PastRuns::Run PastRuns::runOf(EventList oldCut, EventList newCut, EventList changes, const FrameRange& allowed) const
 {
-    Run run{oldCut, newCut, EventList(), allowed, {}, {}};
+    const Framerate& framerate = m_context.framerate;
+    Run run{std::move(oldCut), std::move(newCut), EventList(), allowed, {}, {}};
     if (!run.isOfCuts()) {
-        run.changes = changes;
-        run.extent = within(allowed, hullOf(changes, m_context.framerate));
+        run.changes = std::move(changes);
+        run.extent = within(allowed, hullOf(run.changes, framerate));
         run.left = run.extent;
         return run;
     }
-    PictureNames names(m_context.matchBy, m_context.vfxPatterns);
-    const PictureLine oldLine(oldCut, names, m_context.framerate);
-    const PictureLine newLine(newCut, names, m_context.framerate);
-    run.extent = within(allowed, reelsOf(both(oldLine.lit(), newLine.lit()), m_context.framerate));
-    run.left = both(within(allowed, reelsOf(newLine.lit(), m_context.framerate)),
-                    without(reelsOf(oldLine.lit(), m_context.framerate), {allowed}));
+    const FrameRanges oldLit = litFrames(run.oldCut, framerate);
+    const FrameRanges newLit = litFrames(run.newCut, framerate);
+    run.extent = within(allowed, reelsOf(both(oldLit, newLit), framerate));
+    run.left = both(within(allowed, reelsOf(newLit, framerate)), without(reelsOf(oldLit, framerate), {allowed}));
     if (run.left.empty())
         run.left = run.extent;
     return run;
@@ -189,12 +181,22 @@ EventList PastRuns::changesOf(const Run& run) const
     EventList changes;
     try {
         ChangeEdlGenerator generator;
-        generator.configure(m_context.matchBy, m_context.vfxPatterns);
+        configure(generator);
         generator.generate(run.oldCut, run.newCut, changes);
     } catch (Result::Type) {
         changes.clear();
     }
     return changes;
+}
+
+/// Versions of VFX shots are different shots where the patterns can't be used.
+void PastRuns::configure(ChangeEdlGenerator& generator) const
+{
+    try {
+        generator.configure(m_context.matchBy, m_context.vfxPatterns);
+    } catch (Result::Type) {
+        generator.configure(m_context.matchBy, {});
+    }
 }
 
 bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven, const FrameRange& allowed) const
@@ -227,7 +229,7 @@ std::string PastRuns::toBytes() const
     return {archive.data(), archive.data() + archive.size()};
 }
 
-void PastRuns::read(const std::string& bytes)
+bool PastRuns::read(const std::string& bytes)
 {
     ByteArchive archive;
     archive.assign(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
@@ -236,18 +238,20 @@ void PastRuns::read(const std::string& bytes)
         std::uint32_t version = 0;
         archive >> version;
         if (version != BytesVersion)
-            return;
+            return false;
         for (std::size_t count = archive.readCount(); count > 0; --count) {
             EventList oldCut;
             EventList newCut;
             EventList changes;
             FrameRange allowed;
             archive >> oldCut >> newCut >> changes >> allowed.start >> allowed.end;
-            addStored(oldCut, newCut, changes, allowed);
+            m_runs.push_back(runOf(std::move(oldCut), std::move(newCut), std::move(changes), allowed));
         }
     } catch (Result::Type) {
         m_runs.clear();
+        return false;
     }
+    return true;
 }
 
 } // namespace cadrel::core

@@ -16,6 +16,8 @@
 
 namespace cadrel::core {
 
+class ChangeEdlGenerator;
+
 /// The runs that a project has behind it, and so the cut that its sound stands in. A later run hides what an earlier one
 /// did at the same time of the programme.
 ///
@@ -48,14 +50,16 @@ public:
 
     /// The first frame at which the sound stands in another cut than the one given: at which the two differ where both
     /// have a reel, or where they end when a run began with just the cut that is given. Only frames in `asked` count.
+    /// Throws Result::InvalidArgument for a VFX pattern that can't be used.
     std::optional<std::int32_t> firstDifference(const EventList& oldCut, const FrameRanges& asked = {AllTime}) const;
     /// Whether a run has carried out this change EDL in some of `allowed`; one that moves nothing counts as none. A list
     /// that was `given` is compared with all runs, and one that was made of two cuts only with those of given lists.
     bool haveCarriedOut(const EventList& changes, bool isGiven, const FrameRange& allowed = AllTime) const;
 
-    /// For the model's properties. The reader takes what isn't such bytes for no runs.
+    /// For the model's properties.
     std::string toBytes() const;
-    void read(const std::string& bytes);
+    /// Reads them whatever the names are compared by. False for what isn't such bytes; there are no runs then.
+    bool read(const std::string& bytes);
 
 private:
     struct Run {
@@ -69,12 +73,10 @@ private:
         bool isOfCuts() const { return !oldCut.isEmpty() || !newCut.isEmpty(); }
     };
 
-    void addStored(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                   const FrameRange& allowed);
-    Run runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-              const FrameRange& allowed) const;
+    Run runOf(EventList oldCut, EventList newCut, EventList changes, const FrameRange& allowed) const;
     void forgetWithin(const FrameRanges& extent);
     EventList changesOf(const Run& run) const;
+    void configure(ChangeEdlGenerator& generator) const;
 
     Context m_context;
     std::vector<Run> m_runs; ///< the earliest first

@@ -38,8 +38,13 @@ Lines runsOf(const EventList& events, const Framerate& framerate = FrameASecond)
     PictureNames names(MatchBy::RollName, {});
     const PictureLine line(events, names, framerate);
     Lines lines;
-    for (const PictureRun& run : line.runs())
+    core::FrameRanges frames;
+    for (const PictureRun& run : line.runs()) {
+        frames.push_back(run.frames);
         lines.push_back(linesOf(core::FrameRanges{run.frames}).front() + " x" + std::to_string(run.layerCount));
+    }
+    // The frames with a picture are those of the runs.
+    EXPECT_EQ(line.lit(), core::united(frames));
     return lines;
 }
 
