@@ -62,14 +62,43 @@ FrameRanges both(FrameRanges a, const FrameRanges& b)
     return united(std::move(a));
 }
 
-/// The events as a project stores them, which keeps no comments and so not the text of what can't be read.
-EventList asStored(const EventList& events)
+using SharedEvents = std::shared_ptr<const EventList>;
+
+SharedEvents readEvents(ByteArchive& archive)
+{
+    const auto events = std::make_shared<EventList>();
+    archive >> *events;
+    return events;
+}
+
+/// The events as a project stores them, which keeps neither comments, and so not the text of what can't be read, nor whether a
+/// shot runs backwards.
+SharedEvents asStored(const EventList& events)
 {
     ByteArchive archive;
     archive << events;
-    EventList stored;
-    archive >> stored;
-    return stored;
+    return readEvents(archive);
+}
+
+/// The same for comparing pictures. The events that a project stores with all that makes up their picture are shared.
+SharedEvents comparableTo(const EventList& events)
+{
+    const auto isStoredWhole = [](const EventBase& event) { return event.isValid() && !event.isReversed(); };
+    EventList others;
+    for (const auto& event : events.events()) {
+        if (!isStoredWhole(*event))
+            others.add(event);
+    }
+    const SharedEvents stored = asStored(others);
+    std::vector<std::shared_ptr<EventBase>> all = events.events();
+    auto next = stored->events().begin();
+    for (std::shared_ptr<EventBase>& event : all) {
+        if (!isStoredWhole(*event))
+            event = *next++;
+    }
+    const auto comparable = std::make_shared<EventList>();
+    comparable->append(std::move(all));
+    return comparable;
 }
 
 FrameRanges reelsOf(const FrameRanges& lit, const Framerate& framerate)
@@ -113,7 +142,7 @@ void PastRuns::add(const EventList& oldCut, const EventList& newCut, const Event
                    const FrameRange& allowed)
 {
     Run run = runOf(asStored(oldCut), asStored(newCut), asStored(changes), allowed);
-    if (!run.isOfCuts() && run.changes.isEmpty())
+    if (!run.isOfCuts() && run.changes->isEmpty())
         return;
     forgetWithin(run.extent);
     m_runs.push_back(std::move(run));
@@ -124,18 +153,20 @@ void PastRuns::forgetWithin(const FrameRanges& extent)
     std::erase_if(m_runs, [&extent](const Run& run) { return without(run.left, extent).empty(); });
 }
 
-PastRuns::Run PastRuns::runOf(EventList oldCut, EventList newCut, EventList changes, const FrameRange& allowed) const
+PastRuns::Run PastRuns::runOf(SharedEvents oldCut, SharedEvents newCut, SharedEvents changes,
+                              const FrameRange& allowed) const
 {
     const Framerate& framerate = m_context.framerate;
-    Run run{std::move(oldCut), std::move(newCut), EventList(), allowed, {}, {}};
+    Run run{std::move(oldCut), std::move(newCut), std::move(changes), allowed, {}, {}};
     if (!run.isOfCuts()) {
-        run.changes = std::move(changes);
-        run.extent = within(allowed, hullOf(run.changes, framerate));
+        run.extent = within(allowed, hullOf(*run.changes, framerate));
         run.left = run.extent;
         return run;
     }
-    const FrameRanges oldLit = litFrames(run.oldCut, framerate);
-    const FrameRanges newLit = litFrames(run.newCut, framerate);
+    // The cuts make their changes.
+    run.changes = std::make_shared<EventList>();
+    const FrameRanges oldLit = litFrames(*run.oldCut, framerate);
+    const FrameRanges newLit = litFrames(*run.newCut, framerate);
     run.extent = within(allowed, reelsOf(both(oldLit, newLit), framerate));
     run.left = both(within(allowed, reelsOf(newLit, framerate)), without(reelsOf(oldLit, framerate), {allowed}));
     if (run.left.empty())
@@ -147,13 +178,13 @@ std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut, c
 {
     const Framerate& framerate = m_context.framerate;
     PictureNames names(m_context.matchBy, m_context.vfxPatterns);
-    const PictureLine given(asStored(oldCut), names, framerate);
+    const PictureLine given(*comparableTo(oldCut), names, framerate);
     const FrameRanges givenReels = common(reelsOf(given.lit(), framerate), asked);
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend(); ++run) {
         if (run->isOfCuts()) {
-            const PictureLine began(run->oldCut, names, framerate);
-            const PictureLine standing(run->newCut, names, framerate);
+            const PictureLine began(*run->oldCut, names, framerate);
+            const PictureLine standing(*run->newCut, names, framerate);
             const FrameRanges changed = common(within(run->allowed, reelsOf(standing.lit(), framerate)), givenReels);
             const FrameRanges unchanged = common(without(reelsOf(began.lit(), framerate), {run->allowed}), givenReels);
             if (const auto difference = firstDifferenceIn(without(changed, hidden), standing, given))
@@ -174,19 +205,19 @@ std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut, c
     return std::nullopt;
 }
 
-EventList PastRuns::changesOf(const Run& run) const
+std::vector<ChangeStretch> PastRuns::stretchesOf(const Run& run) const
 {
     if (!run.isOfCuts())
-        return run.changes;
+        return core::stretchesOf(*run.changes, m_context.framerate);
     EventList changes;
     try {
         ChangeEdlGenerator generator;
         configure(generator);
-        generator.generate(run.oldCut, run.newCut, changes);
+        generator.generate(*run.oldCut, *run.newCut, changes);
     } catch (Result::Type) {
         changes.clear();
     }
-    return changes;
+    return core::stretchesOf(changes, m_context.framerate);
 }
 
 /// Versions of VFX shots are different shots where the patterns can't be used.
@@ -201,7 +232,7 @@ void PastRuns::configure(ChangeEdlGenerator& generator) const
 
 bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven, const FrameRange& allowed) const
 {
-    const std::vector<ChangeStretch> stretches = stretchesOf(changes, m_context.framerate);
+    const std::vector<ChangeStretch> stretches = core::stretchesOf(changes, m_context.framerate);
     const FrameRanges hull = within(allowed, hullOf(changes, m_context.framerate));
     const bool movesAnything = std::any_of(stretches.begin(), stretches.end(),
                                            [](const ChangeStretch& stretch) { return stretch.shift != 0; });
@@ -210,8 +241,7 @@ bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven, const Fram
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend() && without(hull, hidden) == hull; ++run) {
         const bool isComparable = (isGiven || !run->isOfCuts()) && !within(allowed, run->extent).empty();
-        const std::vector<ChangeStretch> others =
-            isComparable ? stretchesOf(changesOf(*run), m_context.framerate) : std::vector<ChangeStretch>();
+        const std::vector<ChangeStretch> others = isComparable ? stretchesOf(*run) : std::vector<ChangeStretch>();
         if (std::equal(stretches.begin(), stretches.end(), others.begin(), others.end(), isSame))
             return true;
         hidden = both(std::move(hidden), run->extent);
@@ -225,7 +255,7 @@ std::string PastRuns::toBytes() const
     archive << BytesVersion;
     archive.writeCount(m_runs.size());
     for (const Run& run : m_runs)
-        archive << run.oldCut << run.newCut << run.changes << run.allowed.start << run.allowed.end;
+        archive << *run.oldCut << *run.newCut << *run.changes << run.allowed.start << run.allowed.end;
     return {archive.data(), archive.data() + archive.size()};
 }
 
@@ -240,11 +270,11 @@ bool PastRuns::read(const std::string& bytes)
         if (version != BytesVersion)
             return false;
         for (std::size_t count = archive.readCount(); count > 0; --count) {
-            EventList oldCut;
-            EventList newCut;
-            EventList changes;
+            SharedEvents oldCut = readEvents(archive);
+            SharedEvents newCut = readEvents(archive);
+            SharedEvents changes = readEvents(archive);
             FrameRange allowed;
-            archive >> oldCut >> newCut >> changes >> allowed.start >> allowed.end;
+            archive >> allowed.start >> allowed.end;
             m_runs.push_back(runOf(std::move(oldCut), std::move(newCut), std::move(changes), allowed));
         }
     } catch (Result::Type) {

@@ -10,6 +10,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <limits>
+#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
@@ -17,6 +18,7 @@
 namespace cadrel::core {
 
 class ChangeEdlGenerator;
+struct ChangeStretch;
 
 /// The runs that a project has behind it, and so the cut that its sound stands in. A later run hides what an earlier one
 /// did at the same time of the programme.
@@ -63,19 +65,21 @@ public:
 
 private:
     struct Run {
-        EventList oldCut;
-        EventList newCut;
-        EventList changes;
+        std::shared_ptr<const EventList> oldCut;
+        std::shared_ptr<const EventList> newCut;
+        std::shared_ptr<const EventList> changes;
         FrameRange allowed;
         FrameRanges extent; ///< the reels of both cuts, or the hull of the change EDL, within `allowed`
         FrameRanges left;   ///< the reels that the sound stands in after the run, or the hull likewise
 
-        bool isOfCuts() const { return !oldCut.isEmpty() || !newCut.isEmpty(); }
+        bool isOfCuts() const { return !oldCut->isEmpty() || !newCut->isEmpty(); }
     };
 
-    Run runOf(EventList oldCut, EventList newCut, EventList changes, const FrameRange& allowed) const;
+    /// The run of lists as a project stores them.
+    Run runOf(std::shared_ptr<const EventList> oldCut, std::shared_ptr<const EventList> newCut,
+              std::shared_ptr<const EventList> changes, const FrameRange& allowed) const;
     void forgetWithin(const FrameRanges& extent);
-    EventList changesOf(const Run& run) const;
+    std::vector<ChangeStretch> stretchesOf(const Run& run) const;
     void configure(ChangeEdlGenerator& generator) const;
 
     Context m_context;

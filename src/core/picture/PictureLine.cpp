@@ -45,9 +45,13 @@ FrameRanges litFrames(const EventList& events, const Framerate& framerate)
 }
 
 PictureLine::PictureLine(const EventList& events, PictureNames& names, const Framerate& framerate)
-    : m_lit(litFrames(events, framerate))
 {
     addRuns(edgesOf(events, names, framerate));
+    std::vector<FrameRange> frames;
+    frames.reserve(m_runs.size());
+    for (const PictureRun& run : m_runs)
+        frames.push_back(run.frames);
+    m_lit = united(std::move(frames));
 }
 
 std::uint32_t PictureLine::eventOf(const PictureRun& run) const

@@ -38,13 +38,10 @@ Lines runsOf(const EventList& events, const Framerate& framerate = FrameASecond)
     PictureNames names(MatchBy::RollName, {});
     const PictureLine line(events, names, framerate);
     Lines lines;
-    core::FrameRanges frames;
-    for (const PictureRun& run : line.runs()) {
-        frames.push_back(run.frames);
+    for (const PictureRun& run : line.runs())
         lines.push_back(linesOf(core::FrameRanges{run.frames}).front() + " x" + std::to_string(run.layerCount));
-    }
-    // The frames with a picture are those of the runs.
-    EXPECT_EQ(line.lit(), core::united(frames));
+    // No name is needed to tell where there is a picture.
+    EXPECT_EQ(core::litFrames(events, framerate), line.lit());
     return lines;
 }
 
