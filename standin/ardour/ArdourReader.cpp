@@ -495,7 +495,8 @@ void ArdourReader::readLists(SessionId route, const pugi::xml_node& node, Track&
             const std::string_view what = child.attribute("automation-id").value();
             const std::string_view type = parent.parent().attribute("type").value();
             int number = 0;
-            if (what == "gain" && type == "amp")
+            const bool isVca = route < 0;
+            if (what == "gain" && (type == "amp" || isVca))
                 number = Envelope::Curve::Volume;
             else if (what == "pan-azimuth")
                 number = Envelope::Curve::Pan;
@@ -610,6 +611,7 @@ void ArdourReader::readVideo(Project& project)
     const std::optional<SessionId> samples = idIn(offset.substr(offset.starts_with('-') ? 1 : 0));
     if (!samples || *samples > m_session.clock.samplesOf(FurthestTime))
         throw FileFault("Videotimeline", "begins at " + quoted(offset) + ", which is no number of samples");
+    m_session.staying.push_back("the video " + quoted(std::string_view(name)));
     const double begin = m_session.clock.secondsOf(*samples) * (offset.starts_with('-') ? -1.0 : 1.0);
     // The session doesn't tell how long its video is: to the end of the programme.
     const double end = std::max(project.setEndTime(), contentEnd(project));

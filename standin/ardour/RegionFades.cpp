@@ -23,6 +23,9 @@ constexpr std::int64_t DefaultFade = ArdourSession::DefaultFade;
 constexpr double NearDrawn = 5e-7;
 constexpr double NearDip = 2e-3;
 
+/// A curve is halved so often between two of its points, and not at all where it has more of them than any user draws.
+constexpr int DeepestRefinement = 12;
+constexpr std::size_t MostBends = 2000;
 /// Just before a sample, in samples.
 constexpr double Hair = 1e-6;
 /// No fade of the user's is louder.
@@ -99,9 +102,9 @@ pugi::xml_node addList(pugi::xml_node& element, const FadeNames& names, const ch
 /// Adds samples between two until what is straight between those is near to a curve, which may step at the last.
 template <class Curve>
 void refine(std::vector<std::int64_t>& samples, std::int64_t first, std::int64_t last, const Curve& valueAt,
-            double near)
+            double near, int depth)
 {
-    if (last - first < 2)
+    if (last - first < 2 || depth == 0)
         return;
     const double from = valueAt(static_cast<double>(first));
     const double to = valueAt(static_cast<double>(last) - Hair);
@@ -114,9 +117,9 @@ void refine(std::vector<std::int64_t>& samples, std::int64_t first, std::int64_t
     if (isStraight)
         return;
     const std::int64_t middle = first + width / 2;
-    refine(samples, first, middle, valueAt, near);
+    refine(samples, first, middle, valueAt, near, depth - 1);
     samples.push_back(middle);
-    refine(samples, middle, last, valueAt, near);
+    refine(samples, middle, last, valueAt, near, depth - 1);
 }
 
 } // namespace
@@ -215,7 +218,7 @@ private:
         for (auto bend = bends.begin(); std::next(bend) != bends.end(); ++bend) {
             const std::int64_t next = *std::next(bend);
             std::vector<std::int64_t> samples{*bend};
-            refine(samples, *bend, next, valueAt, near);
+            refine(samples, *bend, next, valueAt, near, bends.size() > MostBends ? 0 : DeepestRefinement);
             for (const std::int64_t sample : samples)
                 put(sample, valueAt(static_cast<double>(sample)));
             // Where fades overlap, Ardour's sound steps at the ends of both.

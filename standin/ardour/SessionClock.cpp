@@ -163,14 +163,14 @@ std::int64_t SessionClock::samplesOf(double seconds) const
     return static_cast<std::int64_t>(std::floor(seconds * static_cast<double>(m_sampleRate) + 0.5 + 1e-6));
 }
 
-std::string SessionClock::timeText(std::int64_t samples, std::int64_t superclocksBefore) const
+std::string SessionClock::timeText(std::int64_t samples, bool isBefore) const
 {
     if (!m_hasUnits)
-        return std::to_string(samples);
+        return std::to_string(samples - (isBefore ? 1 : 0));
     const std::int64_t whole = samples / m_sampleRate * SuperclocksPerSecond;
     // Rounded up, since Ardour rounds down to the sample.
     const std::int64_t rest = (samples % m_sampleRate * SuperclocksPerSecond + m_sampleRate - 1) / m_sampleRate;
-    return std::string("a").append(std::to_string(whole + rest - superclocksBefore));
+    return std::string("a").append(std::to_string(whole + rest - (isBefore ? 1 : 0)));
 }
 
 std::vector<double> SessionClock::bendsBetween(double start, double end) const

@@ -46,9 +46,9 @@ public:
     /// The nearest sample; of two that are equally near the later one.
     std::int64_t samplesOf(double seconds) const;
 
-    /// A time as it is written; `superclocksBefore` is how much earlier than the sample, which no session before 7000 can
-    /// tell.
-    std::string timeText(std::int64_t samples, std::int64_t superclocksBefore = 0) const;
+    /// A time as it is written. `isBefore` is for the last time before the sample: a superclock earlier or, in a session that
+    /// counts samples, a sample.
+    std::string timeText(std::int64_t samples, bool isBefore = false) const;
 
     /// The times between two, in seconds, at which the tempo changes, and where a line over musical time bends.
     std::vector<double> bendsBetween(double start, double end) const;

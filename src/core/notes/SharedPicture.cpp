@@ -24,6 +24,8 @@ constexpr std::size_t FramesOfAWord = 64;
 /// more than the programme, so that the starts or the ends of the events decide, whichever fit better.
 std::int64_t shiftBetween(const ShownRun& oldRun, const ShownRun& newRun)
 {
+    if (oldRun.sourceStep == newRun.sourceStep)
+        return std::llround((newRun.source - oldRun.source) / oldRun.sourceStep);
     const double speed = (oldRun.eventLength < newRun.eventLength ? newRun : oldRun).sourceStep;
     const auto startOf = [](const ShownRun& run) { return run.source - run.eventFrame * run.sourceStep; };
     const auto endOf = [&](const ShownRun& run) { return startOf(run) + run.eventLength * run.sourceStep; };

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "core/edl/EventBase.h"
 #include "core/notes/ChangeNotes.h"
 #include "core/notes/KeptStretches.h"
 #include "core/notes/StepChanges.h"
@@ -14,7 +15,10 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <memory>
+#include <stdexcept>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::tests {
@@ -91,6 +95,40 @@ std::string playAll(const EventList& oldCut, const EventList& newCut, const Pict
         }
     }
     return ends == moves.size() ? player.difference() : "a move between reels has no other end, or two";
+}
+
+/// One event for each reel, of so many frames at a frame of the day.
+EventList reelsOf(const std::vector<std::pair<int, int>>& startsAndLengths)
+{
+    EventList events;
+    for (const auto& [start, length] : startsAndLengths) {
+        auto event = std::make_shared<EventBase>();
+        event->setRollName(std::string("R").append(std::to_string(events.size())));
+        event->setTimecodes(Timecode(0), Timecode(length), Timecode(start), Timecode(start + length));
+        events.add(event);
+    }
+    return events;
+}
+
+TEST(NotesPlayer, RefusesAStepThatLaysOneReelOnAnother)
+{
+    const TestProject project(Framerate(25, 0));
+    const EventList cut = reelsOf({{90000, 100}, {92000, 100}});
+    const PictureRules rules{project.framerate, MatchBy::RollName, {}};
+    NoteStep insert;
+    insert.place = {0, 100, 90000};
+    insert.inserted = {0, 1};
+    NoteStep shift;
+    shift.action = StepAction::MoveReel;
+    shift.from = {0, 0, 90000};
+    shift.place = {0, 0, 91900};
+    shift.changes.resize(1);
+    shift.changes[0].frames = 1900;
+    NotesPlayer player(cut, cut, rules, {{0, 0}, {1, 1}});
+
+    EXPECT_NO_THROW(player.carryOut(shift));
+    insert.place.reelStart = 91900;
+    EXPECT_THROW(player.carryOut(insert), std::logic_error);
 }
 
 RC_GTEST_PROP(NotesLaw, TheStepsTurnTheOldCutIntoTheNewOne, ())

@@ -219,7 +219,7 @@ TEST(ArdourForm, ReadsAndWritesAVcaAsABus)
     text.insert(text.find("  <Playlists>"), vca);
     const SessionProject session(text);
     EXPECT_EQ(session.text(), text);
-    Envelope& curve = *session.track("VCA 1").curves().rbegin()->second;
+    Envelope& curve = session.track("VCA 1").curve(Envelope::Curve::Volume);
     ASSERT_EQ(curve.childCount(), 2U);
     curve.lastChild()->setSpan(2.0, 2.0);
     EXPECT_TRUE(contains(session.text(), "a0 1\na564480000 0.5\n"));
@@ -289,6 +289,7 @@ TEST(ArdourForm, ReadsTheVideoOfTheTimelineAsTheOldPicture)
     EXPECT_EQ(later.start(), 2.0);
     EXPECT_EQ(later.end(), 10.0);
     EXPECT_EQ(later.sourceOffset(), 0.0);
+    EXPECT_EQ(session.project->form()->staying(), std::vector<std::string>{"the video \"reel.mov\""});
 
     const SessionProject before(videoAt(R"(Filename="/pix/reel.mov" VideoOffset="-48000")"));
     const auto& sooner = static_cast<const ClipEvent&>(*before.track("Video").firstChild());

@@ -166,10 +166,22 @@ TEST(VideoFault, TheFramesAroundABrokenPartAreStillShown)
     }
 }
 
+TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeIsBroken)
+{
+    const TempFolder folder;
+    std::string bytes = contentOf(videoOf(Film));
+    // The table of the sizes of the pictures claims to have half a thousand million, each of its own size.
+    const std::size_t table = bytes.find("stsz");
+    ASSERT_NE(table, std::string::npos);
+    bytes.replace(table + 8, 8, std::string("\x00\x00\x00\x00\x1f\xff\xff\x00", 8));
+
+    EXPECT_EQ(reasonToOpen(folder.write("greedy.mp4", bytes)), Reason::Broken);
+}
+
 TEST(VideoFault, APictureOfTooManyPixelsIsNotRead)
 {
     const TempFolder folder;
-    // A file that claims to have a picture of 16384 by 16384 pixels.
+    // 67 million, and 37 million are the most.
     const fs::path large = madeFile(folder, "large.mov", "-f lavfi -i color=red:s=16384x4096 -frames:v 1 -c:v mjpeg");
 
     EXPECT_EQ(reasonToOpen(large), Reason::TooLarge);
