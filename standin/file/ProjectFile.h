@@ -11,6 +11,7 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace standin {
 
@@ -20,7 +21,16 @@ class Project;
 /// What is wrong with a project file. `what()` is one line: the file, the place in it and the fault.
 class ProjectFileError : public std::runtime_error {
 public:
-    using std::runtime_error::runtime_error;
+    explicit ProjectFileError(const std::string& fault, std::string remedy = {})
+        : std::runtime_error(fault), m_remedy(std::move(remedy))
+    {
+    }
+
+    /// What the user can do; empty where it isn't known.
+    const std::string& remedy() const { return m_remedy; }
+
+private:
+    std::string m_remedy;
 };
 
 /// Another program has written the file that a project was to replace.
@@ -45,9 +55,10 @@ public:
     /// Throws ProjectFileError when a project of its form can't be written there, whatever is in it.
     static void requireWritable(const Project& project, const std::filesystem::path& file);
     /// Replaces the file in one step: whatever happens, there is either the whole former file or the whole new one. With an
-    /// `expected` stamp the file has to be as it was then; else ProjectFileChanged is thrown. Throws ProjectFileError.
-    static void write(const Project& project, const std::filesystem::path& file,
-                      const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
+    /// `expected` stamp the file has to be as it was then; else ProjectFileChanged is thrown. Throws ProjectFileError. Answers
+    /// what it has written.
+    static std::string write(const Project& project, const std::filesystem::path& file,
+                             const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
     /// The content of the file. Throws ProjectFileError, without a name, for a project that no file can hold.
     static std::string toText(const Project& project);
 };
