@@ -1,0 +1,147 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/boxes/FileBox.h"
+
+#include "desktop/boxes/BoxText.h"
+
+namespace desktop {
+
+namespace {
+
+constexpr int Width = 760;
+constexpr int Height = 540;
+
+int flagsOf(bool isSave)
+{
+    using Browser = juce::FileBrowserComponent;
+    return Browser::canSelectFiles | (isSave ? Browser::saveMode | Browser::doNotClearFileNameOnRootChange
+                                             : Browser::openMode | Browser::canSelectMultipleItems);
+}
+
+juce::String describe(const FileFilters& filters)
+{
+    juce::StringArray texts;
+    for (const auto& filter : filters)
+        texts.add(juce::String::fromUTF8(filter.description.c_str()) + " (*." +
+                  juce::String::fromUTF8(filter.extension.c_str()) + ")");
+    return texts.joinIntoString(", ");
+}
+
+std::filesystem::path pathOf(const juce::File& file)
+{
+    return file.getFullPathName().toStdString();
+}
+
+juce::File fileOf(const std::filesystem::path& path)
+{
+    return juce::File(juce::String::fromUTF8(path.string().c_str()));
+}
+
+} // namespace
+
+FileBox::FileBox(const standin::UserBoxes::FileQuestion& question, const std::filesystem::path& folder, AskBack askBack)
+    : Box("File Box", toJuce(question.title)), FileFilter(describe(question.filters)), m_filters(question.filters),
+      m_isSave(question.isSave), m_askBack(std::move(askBack)),
+      m_browser(flagsOf(question.isSave), fileOf(folder), this, nullptr), m_accept(question.isSave ? "Save" : "Open")
+{
+    m_browser.addListener(this);
+    m_browser.setFilenameBoxLabel("Name");
+    m_accept.onClick = [this] { accept(); };
+    m_cancel.onClick = [this] { cancel(); };
+    addAndMakeVisible(m_browser);
+    addAndMakeVisible(m_accept);
+    addAndMakeVisible(m_cancel);
+    setPanelSize(Width, Height);
+    selectionChanged();
+}
+
+FileBox::~FileBox()
+{
+    m_browser.removeListener(this);
+}
+
+void FileBox::cancel()
+{
+    m_files.clear();
+    setDone();
+}
+
+juce::Component* FileBox::firstFocus()
+{
+    // The name, which is the only editor that isn't in the box of folders.
+    for (juce::Component* const child : m_browser.getChildren()) {
+        if (dynamic_cast<juce::TextEditor*>(child))
+            return child;
+    }
+    return nullptr;
+}
+
+void FileBox::layOut()
+{
+    juce::Rectangle<int> area = content();
+    layOutButtons(area.removeFromBottom(ButtonHeight), {&m_accept, &m_cancel});
+    m_browser.setBounds(area.withTrimmedBottom(Margin));
+}
+
+bool FileBox::isFileSuitable(const juce::File& file) const
+{
+    return fits(pathOf(file), m_filters);
+}
+
+bool FileBox::isDirectorySuitable(const juce::File& /*file*/) const
+{
+    return true;
+}
+
+void FileBox::selectionChanged()
+{
+    m_accept.setEnabled(m_isSave || m_browser.currentFileIsValid());
+}
+
+void FileBox::fileDoubleClicked(const juce::File& file)
+{
+    // A folder is opened by the list itself.
+    if (!file.isDirectory())
+        accept();
+}
+
+void FileBox::accept()
+{
+    if (isDone())
+        return;
+    m_isSave ? save() : open();
+}
+
+void FileBox::open()
+{
+    m_files.clear();
+    for (int index = 0; index < m_browser.getNumSelectedFiles(); ++index) {
+        const juce::File file = m_browser.getSelectedFile(index);
+        if (file.existsAsFile())
+            m_files.push_back(pathOf(file));
+    }
+    if (!m_files.empty())
+        setDone();
+}
+
+void FileBox::save()
+{
+    const juce::File named = m_browser.getSelectedFile(0);
+    if (named == juce::File() || named == m_browser.getRoot())
+        return;
+    if (named.isDirectory()) {
+        m_browser.setRoot(named);
+        return;
+    }
+    const std::filesystem::path file = withExtension(pathOf(named), m_filters);
+    const juce::File target = fileOf(file);
+    if (target.isDirectory() || !target.getParentDirectory().isDirectory())
+        return;
+    if (target.existsAsFile() &&
+        !m_askBack("The file \"" + target.getFileName() + "\" is there already. Is it to be overwritten?", "Overwrite"))
+        return;
+    m_files = {file};
+    setDone();
+}
+
+} // namespace desktop

@@ -1,0 +1,152 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/shell/XContainer.h"
+
+#include <X11/Xlib.h>
+#include <X11/Xutil.h>
+
+#include <algorithm>
+
+namespace desktop {
+
+namespace {
+
+/// A black frame around content that comes a moment later would flash.
+constexpr unsigned long Background = 0x22292b;
+
+bool isWithin(Display* display, Window window, Window container)
+{
+    while (window != container && window > PointerRoot) {
+        Window root = 0;
+        Window parent = 0;
+        Window* children = nullptr;
+        unsigned count = 0;
+        if (XQueryTree(display, window, &root, &parent, &children, &count) == 0)
+            return false;
+        if (children)
+            XFree(children);
+        window = parent;
+    }
+    return window == container;
+}
+
+} // namespace
+
+XContainer::XContainer(Window around) : m_around(around)
+{
+    Display* const display = m_connection.display();
+    if (!display || around == 0)
+        return;
+    m_window = XCreateSimpleWindow(display, around, 0, 0, 1, 1, 0, 0, Background);
+    XSelectInput(display, m_window, KeyPressMask | KeyReleaseMask);
+    XSync(display, False);
+}
+
+XContainer::~XContainer()
+{
+    if (!m_window)
+        return;
+    if (hasKeyboard())
+        giveKeyboardAway();
+    XDestroyWindow(m_connection.display(), m_window);
+    XSync(m_connection.display(), False);
+}
+
+int XContainer::descriptor() const
+{
+    return ConnectionNumber(m_connection.display());
+}
+
+void XContainer::serve()
+{
+    Display* const display = m_connection.display();
+    while (XPending(display) > 0) {
+        XEvent event;
+        XNextEvent(display, &event);
+        if (event.type == MappingNotify)
+            XRefreshKeyboardMapping(&event.xmapping);
+        if (event.type != KeyPress && event.type != KeyRelease)
+            continue;
+        event.xkey.window = m_around;
+        event.xkey.subwindow = None;
+        XSendEvent(display, m_around, True, event.type == KeyPress ? KeyPressMask : KeyReleaseMask, &event);
+        XFlush(display);
+    }
+}
+
+bool XContainer::moveTo(const Place& place)
+{
+    if (place == m_place)
+        return false;
+    m_place = place;
+    XMoveResizeWindow(m_connection.display(), m_window, place.x, place.y,
+                      static_cast<unsigned>(std::max(place.width, 1)),
+                      static_cast<unsigned>(std::max(place.height, 1)));
+    XSync(m_connection.display(), False);
+    return true;
+}
+
+void XContainer::show()
+{
+    m_isShown = true;
+    XMapRaised(m_connection.display(), m_window);
+    XSync(m_connection.display(), False);
+}
+
+void XContainer::hide()
+{
+    if (hasKeyboard())
+        giveKeyboardAway();
+    m_isShown = false;
+    XUnmapWindow(m_connection.display(), m_window);
+    XSync(m_connection.display(), False);
+}
+
+std::optional<XContainer::Picture> XContainer::picture() const
+{
+    Display* const display = m_connection.display();
+    XWindowAttributes attributes;
+    if (!m_isShown || XGetWindowAttributes(display, m_window, &attributes) == 0 || attributes.map_state != IsViewable)
+        return std::nullopt;
+    Window child = 0;
+    int left = 0;
+    int top = 0;
+    XTranslateCoordinates(display, m_window, attributes.root, 0, 0, &left, &top, &child);
+    const int firstX = std::max(0, -left);
+    const int firstY = std::max(0, -top);
+    const int lastX = std::min(attributes.width, WidthOfScreen(attributes.screen) - left);
+    const int lastY = std::min(attributes.height, HeightOfScreen(attributes.screen) - top);
+    if (firstX >= lastX || firstY >= lastY)
+        return std::nullopt;
+    XImage* const image = XGetImage(display, m_window, firstX, firstY, static_cast<unsigned>(lastX - firstX),
+                                    static_cast<unsigned>(lastY - firstY), AllPlanes, ZPixmap);
+    if (!image)
+        return std::nullopt;
+    Picture picture{attributes.width, attributes.height, {}};
+    picture.pixels.assign(static_cast<std::size_t>(picture.width) * static_cast<std::size_t>(picture.height),
+                          static_cast<std::uint32_t>(Background));
+    for (int y = firstY; y < lastY; ++y) {
+        for (int x = firstX; x < lastX; ++x)
+            picture.pixels[static_cast<std::size_t>(y) * static_cast<std::size_t>(picture.width) +
+                           static_cast<std::size_t>(x)] =
+                static_cast<std::uint32_t>(XGetPixel(image, x - firstX, y - firstY) & 0xffffffUL);
+    }
+    XDestroyImage(image);
+    return picture;
+}
+
+bool XContainer::hasKeyboard() const
+{
+    Window focused = 0;
+    int revert = 0;
+    XGetInputFocus(m_connection.display(), &focused, &revert);
+    return isWithin(m_connection.display(), focused, m_window);
+}
+
+void XContainer::giveKeyboardAway()
+{
+    XSetInputFocus(m_connection.display(), m_around, RevertToParent, CurrentTime);
+    XSync(m_connection.display(), False);
+}
+
+} // namespace desktop
