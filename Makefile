@@ -15,7 +15,7 @@
 PRESET ?= release
 FUZZ_SECONDS ?= 20
 
-sources = $(shell find src standin app examples tests bench fuzz -name '*.cpp' -o -name '*.h')
+sources = $(shell find src standin app desktop examples tests bench fuzz -name '*.cpp' -o -name '*.h')
 reel3 = examples/reel3
 picture_tests = cadrel_gui_window_tests
 

@@ -1,6 +1,6 @@
 #!/bin/sh
 # SPDX-License-Identifier: GPL-3.0-or-later
-# check-includes.sh [TREE]: holds every include of src, standin and app that names a file of the tree against the table
+# check-includes.sh [TREE]: holds every include of src, standin, app and desktop that names a file of the tree against the table
 # "Rooms" in the tree's CONTRIBUTING.md. Prints what is refused, and fails then. Without TREE it is this one.
 set -eu
 cd "${1:-$(dirname "$0")/..}"
@@ -13,7 +13,7 @@ files() {
 
 # The names have no spaces, so each line of `files` is one argument.
 # shellcheck disable=SC2046
-files src standin app tests bench fuzz examples | awk '
+files src standin app desktop tests bench fuzz examples | awk '
 function roomOf(file) {
     sub(/\/[^\/]*$/, "", file)
     return file
@@ -92,4 +92,4 @@ END {
         refuse("There is nothing to check")
     exit refused > 0
 }
-' - CONTRIBUTING.md $(files src standin app)
+' - CONTRIBUTING.md $(files src standin app desktop)

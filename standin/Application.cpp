@@ -118,7 +118,16 @@ Project& Application::createProject()
 
 Project& Application::openProject(const fs::path& file)
 {
-    const auto project = ProjectFile::read(file, edits().log());
+    return add(ProjectFile::read(file, edits().log()), file);
+}
+
+Project& Application::openProject(const fs::path& file, std::string_view content)
+{
+    return add(ProjectFile::parse(content, file.string(), edits().log()), file);
+}
+
+Project& Application::add(const Counted<Project>& project, const fs::path& file)
+{
     project->setPath(fullPathOf(file));
     return add(project);
 }
@@ -129,16 +138,17 @@ Project& Application::add(Counted<Project> project)
     return projects().add(std::move(project));
 }
 
-void Application::saveProject(Project& project, const fs::path& file,
-                              const std::optional<cadrel::util::FileStamp>& expected)
+std::string Application::saveProject(Project& project, const fs::path& file,
+                                     const std::optional<cadrel::util::FileStamp>& expected)
 {
     std::u16string path = fullPathOf(file);
     project.announceStoring();
-    ProjectFile::write(project, file, expected);
-    if (path == project.path())
-        return;
-    project.setPath(std::move(path));
-    projects().renamed(project);
+    std::string text = ProjectFile::write(project, file, expected);
+    if (path != project.path()) {
+        project.setPath(std::move(path));
+        projects().renamed(project);
+    }
+    return text;
 }
 
 void Application::activateProject(Project* project)

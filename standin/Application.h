@@ -11,6 +11,8 @@
 #include <filesystem>
 #include <memory>
 #include <optional>
+#include <string>
+#include <string_view>
 
 namespace standin {
 
@@ -53,10 +55,13 @@ public:
     Project& createProject();
     /// Reads a project file and tells the listeners. Throws ProjectFileError; nothing is opened then.
     Project& openProject(const std::filesystem::path& file);
+    /// The same with this content, which the file may have had or may get.
+    Project& openProject(const std::filesystem::path& file, std::string_view content);
     /// Lets the listeners store what they have, and writes the project. With an `expected` stamp the file has to be as it was
-    /// then; else ProjectFileChanged is thrown. Throws ProjectFileError, with the former file untouched.
-    void saveProject(Project& project, const std::filesystem::path& file,
-                     const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
+    /// then; else ProjectFileChanged is thrown. Throws ProjectFileError, with the former file untouched. Answers what it has
+    /// written.
+    std::string saveProject(Project& project, const std::filesystem::path& file,
+                            const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
     /// Null makes none active.
     void activateProject(Project* project);
     /// Commits the transaction if one is open.
@@ -86,6 +91,7 @@ private:
     struct Services;
 
     Project& add(Velmark::Counted<Project> project);
+    Project& add(const Velmark::Counted<Project>& project, const std::filesystem::path& file);
 
     std::unique_ptr<Services> m_services;
 };

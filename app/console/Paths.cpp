@@ -6,6 +6,7 @@
 #include "util/FilePath.h"
 #include "util/Result.h"
 #include "util/StringUtil.h"
+#include "util/WriteObstacle.h"
 
 #include <algorithm>
 #include <cstdint>
@@ -19,9 +20,6 @@ namespace cadrel::app {
 namespace fs = std::filesystem;
 
 namespace {
-
-/// Bytes, on the file systems in use.
-constexpr std::size_t LongestName = 255;
 
 /// Bytes. The list of a feature film has a hundredth of it.
 constexpr std::uintmax_t LargestEdl = std::uintmax_t{256} * 1024 * 1024;
@@ -107,39 +105,11 @@ Failure unreadable(const std::string& path, FileKind kind)
     return {path, "can't be read to its end", "check the disk or copy the file anew"};
 }
 
-namespace {
-
-std::optional<Failure> obstacleToWriting(const std::string& path)
-{
-    std::error_code error;
-    if (fs::is_directory(path, error))
-        return Failure{path, "is a folder", "give the name of a file in it"};
-    const fs::path parent = fs::path(path).parent_path();
-    const fs::path folder = parent.empty() ? fs::path(".") : parent;
-    if (!fs::exists(folder, error))
-        return Failure{path, "the folder does not exist", "make it or give another"};
-    if (!fs::is_directory(folder, error))
-        return Failure{path, "what should be the folder is a file", "give another name"};
-    if (fs::path(path).filename().string().size() > LongestName)
-        return Failure{path, "the name is too long", "give a shorter one"};
-    const bool exists = fs::exists(path, error);
-    if (exists && access(path.c_str(), W_OK) != 0)
-        return Failure{path, "is protected against writing", "give another name"};
-    const bool isReplaced = !exists || fs::is_regular_file(path, error);
-    if (isReplaced && access(folder.c_str(), W_OK) != 0)
-        return Failure{path, "you may not write into the folder", "give another folder"};
-    if (!isReplaced)
-        return Failure{path, "can't be written", "see whether the disk is full"};
-    return std::nullopt;
-}
-
-} // namespace
-
 Failure unwritable(const std::vector<std::string>& paths)
 {
     for (const std::string& path : paths) {
-        if (const std::optional<Failure> obstacle = obstacleToWriting(path))
-            return *obstacle;
+        if (const std::optional<util::WriteObstacle> obstacle = util::WriteObstacle::of(path))
+            return {path, obstacle->problem, obstacle->remedy};
     }
     return {paths.front(), "can't be written", "see whether the disk is full, or give another name"};
 }

@@ -6,6 +6,7 @@
 #include "standin/changes/ChangeNotes.h"
 #include "velmark/Implements.h"
 
+#include <cstdint>
 #include <memory>
 
 namespace standin {
@@ -38,12 +39,17 @@ public:
     /// Whether edits are taken down: the project is there and open, and so is a transaction. May be asked at any time.
     bool isRecording() const { return m_project && m_isOpen && m_log.isOpen(); }
     void record(std::unique_ptr<Edit> edit) { m_log.add(*m_project, std::move(edit)); }
+    /// How many changes below the project itself were made that no undo takes back. That of the project's own values isn't
+    /// among them.
+    std::uint64_t unrecordedChanges() const { return m_unrecordedChanges; }
+    void countUnrecorded() { ++m_unrecordedChanges; }
 
 private:
     Project* m_project;
     ChangeNotes m_changes;
     ChangeLog& m_log;
     bool m_isOpen = false;
+    std::uint64_t m_unrecordedChanges = 0;
 };
 
 } // namespace standin

@@ -9,7 +9,7 @@ namespace standin {
 void UndoList::add(std::u16string name, ChangeLog::Edits edits)
 {
     m_entries.resize(m_done);
-    m_entries.push_back({std::move(name), std::move(edits)});
+    m_entries.push_back({++m_lastNumber, std::move(name), std::move(edits)});
     ++m_done;
 }
 

@@ -5,6 +5,7 @@
 #include "standin/changes/ChangeLog.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -29,15 +30,19 @@ public:
     std::size_t size() const { return m_entries.size(); }
     std::size_t doneCount() const { return m_done; }
     const std::u16string& nameAt(std::size_t index) const { return m_entries[index].name; }
+    /// Where the list stands: the same number again means that the same entries are done. 0 before the first of them.
+    std::uint64_t state() const { return m_done > 0 ? m_entries[m_done - 1].number : 0; }
 
 private:
     struct Entry {
+        std::uint64_t number; ///< no other entry ever has it
         std::u16string name;
         ChangeLog::Edits edits;
     };
 
     std::vector<Entry> m_entries;
     std::size_t m_done = 0;
+    std::uint64_t m_lastNumber = 0;
 };
 
 } // namespace standin

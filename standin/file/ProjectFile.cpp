@@ -133,17 +133,18 @@ void ProjectFile::requireWritable(const Project& project, const fs::path& file)
     }
 }
 
-void ProjectFile::write(const Project& project, const fs::path& file, const std::optional<FileStamp>& expected)
+std::string ProjectFile::write(const Project& project, const fs::path& file, const std::optional<FileStamp>& expected)
 {
     requireWritable(project, file);
     try {
         const ProjectForm* const form = project.form();
-        const std::string text = contentFor(project);
+        std::string text = contentFor(project);
         FileReplacement replacement(file);
         replacement.write(text);
         replacement.commit(expected);
         if (form)
             form->wasWritten(file);
+        return text;
     } catch (const FileFault& fault) {
         fail(file.string(), std::string("this project can't be stored: ") + fault.what());
     } catch (const FileReplacement::TargetChanged&) {

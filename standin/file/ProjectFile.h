@@ -45,9 +45,10 @@ public:
     /// Throws ProjectFileError when a project of its form can't be written there, whatever is in it.
     static void requireWritable(const Project& project, const std::filesystem::path& file);
     /// Replaces the file in one step: whatever happens, there is either the whole former file or the whole new one. With an
-    /// `expected` stamp the file has to be as it was then; else ProjectFileChanged is thrown. Throws ProjectFileError.
-    static void write(const Project& project, const std::filesystem::path& file,
-                      const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
+    /// `expected` stamp the file has to be as it was then; else ProjectFileChanged is thrown. Throws ProjectFileError. Answers
+    /// what it has written.
+    static std::string write(const Project& project, const std::filesystem::path& file,
+                             const std::optional<cadrel::util::FileStamp>& expected = std::nullopt);
     /// The content of the file. Throws ProjectFileError, without a name, for a project that no file can hold.
     static std::string toText(const Project& project);
 };

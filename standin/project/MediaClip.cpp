@@ -77,8 +77,11 @@ void MediaClip::markContentChanged()
 {
     updateCaption();
     Node::markContentChanged();
-    if (ProjectLink* const link = this->link())
+    if (ProjectLink* const link = this->link()) {
         link->changes().markPool();
+        // Clips of the pool stay when what brought them is undone.
+        link->countUnrecorded();
+    }
 }
 
 } // namespace standin

@@ -6,6 +6,8 @@
 #include "standin/base/Text.h"
 #include "velmark/IString.h"
 
+#include <utility>
+
 using namespace Velmark;
 
 namespace standin {
@@ -112,6 +114,12 @@ double Node::getSourceOffset(FUnknown* /*container*/)
 INodeIterator* Node::newChildIterator()
 {
     return makeCounted<NoChildren>().detach();
+}
+
+void Node::setSelected(bool selected)
+{
+    if (std::exchange(m_isSelected, selected) != selected)
+        countUnrecorded();
 }
 
 void Node::setName(std::u16string name)

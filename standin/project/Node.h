@@ -98,7 +98,7 @@ public:
     void setAttribute(const std::string& key, std::optional<Attribute> attribute);
     bool selected() const { return m_isSelected; }
     /// Doesn't count as a change.
-    void setSelected(bool selected) { m_isSelected = selected; }
+    void setSelected(bool selected);
     /// Members of the project file that this version doesn't know, as the text of a JSON object; empty without any.
     const std::string& unknownMembers() const;
     void setUnknownMembers(std::string json);
@@ -122,6 +122,8 @@ protected:
         Value former = (object.*exchange)(std::move(value));
         if (ProjectLink* const recording = recordingLink())
             recording->record(std::make_unique<ValueEdit<Object, Value>>(object, exchange, std::move(former)));
+        else
+            countUnrecorded();
     }
 
 private:
@@ -155,6 +157,8 @@ private:
     ProjectLink* home();
     /// That link when edits are taken down; else null.
     ProjectLink* recordingLink();
+    /// Notes that a change isn't taken down.
+    void countUnrecorded();
 
     /// The absolute start of the parent; 0 without one.
     double parentStart() const;

@@ -3,6 +3,7 @@
 // Where a node stands: the container in which it lies, and its times.
 
 #include "standin/project/Container.h"
+#include "standin/project/Project.h"
 
 #include <algorithm>
 #include <cmath>
@@ -105,6 +106,8 @@ void Node::moveTo(Place place)
     Place other = exchangePlace(place);
     if (ProjectLink* const recording = former ? former : recordingLink())
         recording->record(std::make_unique<ValueEdit<Node, Place>>(*this, &Node::exchangePlace, other));
+    else
+        countUnrecorded();
 }
 
 bool Node::canBelongTo(const Project& project)
@@ -127,6 +130,14 @@ ProjectLink* Node::recordingLink()
     // What was taken out comes back when that is undone, and has to be what it was.
     ProjectLink* const found = link ? link : home();
     return found && found->isRecording() ? found : nullptr;
+}
+
+void Node::countUnrecorded()
+{
+    ProjectLink* const link = this->link();
+    ProjectLink* const found = link ? link : home();
+    if (found && found->project() != this)
+        found->countUnrecorded();
 }
 
 void Node::leaveParent()

@@ -187,13 +187,15 @@ std::vector<Track*> Project::allTracks() const
     return tracks;
 }
 
-void Project::announceStoring()
+bool Project::announceStoring()
 {
     const auto keptAlive = Counted<Project>::share(this);
-    m_storageListeners.anyOf([this](IProjectStorageNotification& listener) {
-        listener.projectStoring(this);
+    bool haveStored = true;
+    m_storageListeners.anyOf([&](IProjectStorageNotification& listener) {
+        haveStored = listener.projectStoring(this) == ResultOk && haveStored;
         return false;
     });
+    return haveStored;
 }
 
 double Project::exchangeEndTime(double seconds)

@@ -82,6 +82,7 @@ public:
     void setOpen(bool isOpen) { m_link->setOpen(isOpen); }
     ChangeLog& log() { return m_link->log(); }
     UndoList& undoList() { return m_undoList; }
+    const UndoList& undoList() const { return m_undoList; }
 
     // What has changed and isn't told yet, as ChangeNotes says.
 
@@ -92,8 +93,8 @@ public:
     bool tellsOfPool() const { return m_link->changes().tellsOfPool(); }
     void clearChanges() { m_link->changes().clear(); }
 
-    /// Calls the storage listeners, for a save that is about to be made.
-    void announceStoring();
+    /// Calls the storage listeners, for a save that is about to be made. False when one of them couldn't store what it has.
+    bool announceStoring();
 
 private:
     double exchangeEndTime(double seconds);

@@ -1,0 +1,54 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include <filesystem>
+#include <optional>
+#include <string>
+#include <sys/types.h>
+
+namespace desktop {
+
+/// Keeps other programs from taking a project for one that nobody has open: a hidden file beside it that this process holds
+/// locked. The system drops the lock when the process ends in whatever way, so what a crash leaves holds nobody up.
+class DocumentLock {
+public:
+    /// Who holds a lock.
+    struct Holder {
+        pid_t process = 0; ///< 0 where it isn't known
+        std::string machine;
+    };
+
+    /// Holds nothing.
+    DocumentLock() = default;
+    /// Takes the lock of the file, unless another has it. Where the folder lets no file be made, nothing is locked.
+    explicit DocumentLock(const std::filesystem::path& file);
+    DocumentLock(DocumentLock&& other) noexcept { swap(other); }
+    DocumentLock& operator=(DocumentLock&& other) noexcept
+    {
+        DocumentLock taken(std::move(other));
+        swap(taken);
+        return *this;
+    }
+    /// Gives it up and removes the file.
+    ~DocumentLock();
+
+    bool isHeld() const { return m_descriptor >= 0; }
+    /// The other process that has the lock.
+    const std::optional<Holder>& holder() const { return m_holder; }
+
+    /// Who has the file open; nothing where nobody has.
+    static std::optional<Holder> holderOf(const std::filesystem::path& file);
+    static std::filesystem::path pathFor(const std::filesystem::path& file);
+
+private:
+    void swap(DocumentLock& other) noexcept;
+    /// Whether that settled it: it is held, or it never will be.
+    bool take();
+
+    std::filesystem::path m_path;
+    int m_descriptor = -1;
+    std::optional<Holder> m_holder;
+};
+
+} // namespace desktop

@@ -1,0 +1,219 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/document/OpenDocument.h"
+
+#include "desktop/document/Autosave.h"
+#include "desktop/document/DocumentError.h"
+#include "standin/Application.h"
+#include "standin/edit/EditService.h"
+#include "standin/file/ProjectFile.h"
+#include "standin/project/Project.h"
+#include "util/WriteObstacle.h"
+
+#include <algorithm>
+#include <system_error>
+#include <utility>
+
+namespace desktop {
+
+namespace fs = std::filesystem;
+
+using cadrel::util::FileStamp;
+using standin::ProjectFileChanged;
+using standin::ProjectFileError;
+using State = SaveAnswer::State;
+
+namespace {
+
+/// A look at the settings of the modules may take one part in so many of the time.
+constexpr int LookShare = 20;
+constexpr auto ShortestLookInterval = std::chrono::milliseconds(500);
+/// And so may an autosave.
+constexpr int AutosaveShare = 20;
+
+bool hasFolder(const fs::path& file)
+{
+    std::error_code error;
+    return fs::is_directory(file.parent_path(), error);
+}
+
+SaveAnswer answerTo(StoredFile::State state, const fs::path& file)
+{
+    switch (state) {
+    case StoredFile::State::Changed:
+        return {State::Changed, file.string() + ": another program has changed it since it was opened or saved here"};
+    case StoredFile::State::Missing:
+        return {State::Missing, hasFolder(file) ? file.string() + ": is no longer there"
+                                                : file.string() + ": its folder is no longer there"};
+    default:
+        return {};
+    }
+}
+
+/// Why a project couldn't be written. What the file system says tells more than that it couldn't.
+std::string failureOf(const fs::path& file, const ProjectFileError& error)
+{
+    const std::string fault = error.what();
+    if (!fault.ends_with(": can't be written"))
+        return fault;
+    if (const auto obstacle = cadrel::util::WriteObstacle::of(file))
+        return file.string() + ": " + obstacle->problem;
+    return fault + "; see whether the disk is full";
+}
+
+} // namespace
+
+OpenDocument::OpenDocument(standin::Application& application, standin::Project& project, StoredFile file,
+                           DocumentLock lock, bool isRecovered)
+    : m_application(application), m_project(Velmark::Counted<standin::Project>::share(&project)),
+      m_file(std::move(file)), m_lock(std::move(lock)),
+      m_mark(isRecovered ? UnsavedMark(project, m_file.print()) : UnsavedMark(project))
+{
+    // The one from which it was opened.
+    if (isRecovered && m_lock.isHeld())
+        m_autosavedVersion = m_mark.version();
+    if (!m_lock.isHeld() && !m_lock.holder())
+        m_autosaveFault = path().parent_path().string() + ": no autosave can be written into this folder";
+}
+
+OpenDocument::~OpenDocument() = default;
+
+bool OpenDocument::settleUnsaved()
+{
+    m_mark.settle();
+    return m_mark.isSet();
+}
+
+std::vector<std::u16string> OpenDocument::undoNames() const
+{
+    const standin::UndoList& list = std::as_const(*m_project).undoList();
+    std::vector<std::u16string> names;
+    for (std::size_t index = 0; index < list.size(); ++index)
+        names.push_back(list.nameAt(index));
+    return names;
+}
+
+std::size_t OpenDocument::undoPosition() const
+{
+    return std::as_const(*m_project).undoList().doneCount();
+}
+
+bool OpenDocument::goToUndoPosition(std::size_t position)
+{
+    standin::EditService& edits = m_application.edits();
+    while (undoPosition() > position) {
+        if (!edits.undo(*m_project))
+            return false;
+    }
+    while (undoPosition() < position) {
+        if (!edits.redo(*m_project))
+            return false;
+    }
+    return true;
+}
+
+SaveAnswer OpenDocument::save()
+{
+    const StoredFile::State state = m_file.lookInside();
+    if (state != StoredFile::State::AsStored)
+        return answerTo(state, path());
+    return write(path(), m_file.stamp());
+}
+
+SaveAnswer OpenDocument::overwrite()
+{
+    return write(path(), std::nullopt);
+}
+
+SaveAnswer OpenDocument::saveAs(const fs::path& path)
+{
+    if (path == this->path())
+        return overwrite();
+    DocumentLock lock(path);
+    if (lock.holder())
+        return {State::Failed, path.string() + ": is open in another window"};
+    const fs::path former = this->path();
+    SaveAnswer answer = write(path, std::nullopt);
+    if (!answer.isSaved())
+        return answer;
+    // The lock tells whose the autosave beside the former file is.
+    if (m_lock.isHeld())
+        Autosave::remove(former);
+    m_lock = std::move(lock);
+    return answer;
+}
+
+SaveAnswer OpenDocument::write(const fs::path& path, const std::optional<FileStamp>& expected)
+{
+    if (isWithinTransaction())
+        return {State::Failed, path.string() + ": can't be saved while the project is being changed"};
+    try {
+        const std::string text = m_application.saveProject(*m_project, path, expected);
+        const ContentPrint print = ContentPrint::of(text);
+        const bool isSameFile = path == this->path();
+        m_file = StoredFile(path, print);
+        m_mark.wasStored(print);
+        if (isSameFile)
+            dropAutosave();
+        m_autosavedVersion.reset();
+        m_autosaveFault.clear();
+        return {};
+    } catch (const ProjectFileChanged&) {
+        return answerTo(StoredFile::State::Changed, path);
+    } catch (const ProjectFileError& error) {
+        return {State::Failed, failureOf(path, error)};
+    }
+}
+
+void OpenDocument::idle(Clock::time_point now, Clock::duration interval)
+{
+    if (isWithinTransaction())
+        return;
+    const Clock::duration pause = std::max<Clock::duration>(ShortestLookInterval, LookShare * m_lookCost);
+    if (!m_lookedAt || now - *m_lookedAt >= pause) {
+        const auto start = Clock::now();
+        m_mark.look(now);
+        m_lookCost = Clock::now() - start;
+        m_lookedAt = now;
+    }
+    if (!m_lock.isHeld())
+        return;
+    if (!m_mark.isSet())
+        return dropAutosave();
+    const Clock::duration wait = std::max(interval, AutosaveShare * m_autosaveCost);
+    if (m_autosavedVersion != m_mark.version() && (!m_autosavedAt || now - *m_autosavedAt >= wait))
+        autosave(now);
+}
+
+void OpenDocument::autosave(Clock::time_point now)
+{
+    m_autosavedAt = now;
+    const auto start = Clock::now();
+    try {
+        const std::string text = m_mark.takeText();
+        if (!m_mark.isSet())
+            return dropAutosave();
+        m_autosavedVersion = m_mark.version();
+        Autosave::write(path(), m_file.print(), text, std::chrono::system_clock::now());
+        m_autosaveFault.clear();
+    } catch (const DocumentError& error) {
+        m_autosaveFault = error.what();
+    } catch (const ProjectFileError& error) {
+        m_autosaveFault = path().string().append(": ").append(error.what());
+    }
+    m_autosaveCost = Clock::now() - start;
+}
+
+void OpenDocument::dropAutosave()
+{
+    if (m_autosavedVersion)
+        Autosave::remove(path());
+    m_autosavedVersion.reset();
+}
+
+bool OpenDocument::isWithinTransaction() const
+{
+    return m_application.edits().isOpen();
+}
+
+} // namespace desktop

@@ -1,0 +1,114 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "desktop/document/DocumentLock.h"
+#include "desktop/document/StoredFile.h"
+#include "desktop/document/UnsavedMark.h"
+#include "velmark/Counted.h"
+
+#include <chrono>
+#include <cstddef>
+#include <filesystem>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace standin {
+class Application;
+class Project;
+} // namespace standin
+
+namespace desktop {
+
+struct Autosave;
+
+/// What became of a save.
+struct SaveAnswer {
+    enum class State {
+        Saved,
+        Changed, ///< another program has changed the file; it is as that left it. Ask: overwrite, save as, or reload
+        Missing, ///< the file is gone. Ask: save it there again, or save as
+        Failed,  ///< nothing was written
+    };
+
+    State state = State::Saved;
+    std::string message; ///< for the user, one line; empty once it is saved
+
+    bool isSaved() const { return state == State::Saved; }
+};
+
+/// A project that is open, and its file. Made and closed by OpenDocuments.
+///
+/// What another program has done to the file is never overwritten unless the user says so. Work that isn't saved is written
+/// beside the file now and then, as Autosave tells; that is gone after a save and after closing.
+class OpenDocument {
+public:
+    using Clock = std::chrono::steady_clock;
+
+    OpenDocument(const OpenDocument&) = delete;
+    OpenDocument& operator=(const OpenDocument&) = delete;
+    ~OpenDocument();
+
+    standin::Project& project() const { return *m_project; }
+    /// The file itself, with no link in its path.
+    const std::filesystem::path& path() const { return m_file.path(); }
+    /// Of the file.
+    std::string name() const { return path().filename().string(); }
+    /// Whether another process had the project open when it was opened. It is left alone: nothing is written automatically.
+    const std::optional<DocumentLock::Holder>& openElsewhere() const { return m_lock.holder(); }
+
+    /// Whether the project would be stored with other bytes than it is. Costs nothing; what a module has changed of its own
+    /// shows after the next idle call.
+    bool isUnsaved() const { return m_mark.isSet(); }
+    /// The same, exact: asks the modules, and compares the bytes. For a question before closing. Not within a transaction.
+    bool settleUnsaved();
+    /// What has become of the file meanwhile, by its size, time and place, and its content where one of these differs.
+    StoredFile::State fileState() { return m_file.look(); }
+    /// Why the last autosave couldn't be written, in one line; empty as long as they can.
+    const std::string& autosaveFault() const { return m_autosaveFault; }
+
+    // The undo list, the oldest entry first.
+
+    std::vector<std::u16string> undoNames() const;
+    /// How many of them are done: 0 for none.
+    std::size_t undoPosition() const;
+    /// Undoes or redoes until so many are done. False when something forbids it, such as an open transaction; then it stands
+    /// as near as it came.
+    bool goToUndoPosition(std::size_t position);
+
+private:
+    friend class OpenDocuments;
+
+    /// A project that has just been opened from `file`. The application outlives it.
+    OpenDocument(standin::Application& application, standin::Project& project, StoredFile file, DocumentLock lock,
+                 bool isRecovered);
+
+    /// Over the file, but only as this document knows it.
+    SaveAnswer save();
+    /// Over whatever the file is by now.
+    SaveAnswer overwrite();
+    /// As a file of that path, which becomes the document's own. Whatever is there is overwritten.
+    SaveAnswer saveAs(const std::filesystem::path& path);
+    SaveAnswer write(const std::filesystem::path& path, const std::optional<cadrel::util::FileStamp>& expected);
+    /// What there is to do while the user does nothing. Autosaves at most once in `interval`.
+    void idle(Clock::time_point now, Clock::duration interval);
+    void autosave(Clock::time_point now);
+    void dropAutosave();
+    bool isWithinTransaction() const;
+
+    standin::Application& m_application;
+    Velmark::Counted<standin::Project> m_project;
+    StoredFile m_file;
+    DocumentLock m_lock;
+    UnsavedMark m_mark;
+    std::optional<Clock::time_point> m_lookedAt;
+    Clock::duration m_lookCost{};
+    std::optional<Clock::time_point> m_autosavedAt;
+    Clock::duration m_autosaveCost{};
+    std::optional<std::uint64_t> m_autosavedVersion; ///< nothing where there is no autosave of ours
+    std::string m_autosaveFault;
+};
+
+} // namespace desktop

@@ -1,0 +1,144 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/document/UnsavedMark.h"
+
+#include "standin/file/ProjectFile.h"
+#include "standin/project/FileFault.h"
+#include "standin/project/Project.h"
+#include "standin/stage/ProjectWriter.h"
+
+namespace desktop {
+
+using standin::ProjectFile;
+
+namespace {
+
+/// Nothing changes for so many times what a comparison costs before one is made.
+constexpr int QuietCosts = 20;
+
+} // namespace
+
+UnsavedMark::UnsavedMark(standin::Project& project) : m_project(project)
+{
+    announce();
+    m_at = positionNow();
+    try {
+        const auto start = Clock::now();
+        m_stored = ContentPrint::of(ProjectFile::toText(m_project));
+        m_cost = Clock::now() - start;
+        m_storedAt = m_at;
+    } catch (const standin::ProjectFileError&) {
+        m_isSet = true;
+    }
+}
+
+UnsavedMark::UnsavedMark(standin::Project& project, const ContentPrint& stored)
+    : m_project(project), m_stored(stored), m_isSet(true)
+{
+    announce();
+    m_at = positionNow();
+    m_isExact = false;
+}
+
+bool UnsavedMark::isSet() const
+{
+    const std::uint64_t undo = m_project.undoList().state();
+    const std::uint64_t unrecorded = m_project.link()->unrecordedChanges();
+    if (undo == m_at.undo && unrecorded == m_at.unrecorded)
+        return m_isSet;
+    return !m_storedAt || *m_storedAt != Position{undo, unrecorded, m_at.head};
+}
+
+void UnsavedMark::look(Clock::time_point now)
+{
+    if (m_project.log().isOpen())
+        return;
+    announce();
+    const std::uint64_t before = m_version;
+    advance();
+    if (m_version != before || !m_since)
+        m_since = now;
+    if (!m_isExact && now - *m_since >= QuietCosts * m_cost)
+        compare();
+}
+
+void UnsavedMark::settle()
+{
+    if (m_project.log().isOpen())
+        return;
+    announce();
+    advance();
+    if (!m_isExact)
+        compare();
+}
+
+std::string UnsavedMark::takeText()
+{
+    announce();
+    advance();
+    return textHere();
+}
+
+std::string UnsavedMark::textHere()
+{
+    const auto start = Clock::now();
+    std::string text = ProjectFile::toText(m_project);
+    const ContentPrint print = ContentPrint::of(text);
+    m_cost = Clock::now() - start;
+    m_isExact = true;
+    m_isSet = print != m_stored;
+    if (!m_isSet)
+        m_storedAt = m_at;
+    return text;
+}
+
+void UnsavedMark::wasStored(const ContentPrint& print)
+{
+    m_canAnnounce = true;
+    m_stored = print;
+    advance();
+    m_storedAt = m_at;
+    m_isSet = false;
+    m_isExact = true;
+}
+
+void UnsavedMark::announce()
+{
+    // A module that can't store says so to the user, once.
+    if (m_canAnnounce)
+        m_canAnnounce = m_project.announceStoring();
+}
+
+std::uint64_t UnsavedMark::headOf() const
+try {
+    return ContentPrint::of(standin::ProjectWriter::textOf(m_project, [](const standin::Node&) { return false; })).hash;
+} catch (const standin::FileFault& fault) {
+    return ContentPrint::of(fault.what()).hash;
+}
+
+UnsavedMark::Position UnsavedMark::positionNow() const
+{
+    return {m_project.undoList().state(), m_project.link()->unrecordedChanges(), headOf()};
+}
+
+void UnsavedMark::advance()
+{
+    const Position position = positionNow();
+    if (position == m_at)
+        return;
+    m_at = position;
+    ++m_version;
+    m_isExact = position == m_storedAt;
+    m_isSet = !m_isExact;
+}
+
+void UnsavedMark::compare()
+try {
+    textHere();
+} catch (const standin::ProjectFileError&) {
+    // No file holds it as it stands.
+    m_isSet = true;
+    m_isExact = true;
+}
+
+} // namespace desktop
