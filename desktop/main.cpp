@@ -15,7 +15,7 @@ int main(int argc, char** argv)
 {
     const desktop::XSession session;
     if (!session.isThere()) {
-        std::cerr << "cadrel open: there is no display: start it on a desktop, or set DISPLAY\n";
+        std::cerr << "cadrel: there is no display; start it on a desktop, or set DISPLAY\n";
         return 1;
     }
     const std::vector<std::filesystem::path> projects(argv + 1, argv + argc);

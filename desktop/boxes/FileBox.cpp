@@ -3,6 +3,7 @@
 #include "desktop/boxes/FileBox.h"
 
 #include "desktop/boxes/BoxText.h"
+#include "gui/look/Text.h"
 
 namespace desktop {
 
@@ -46,6 +47,7 @@ FileBox::FileBox(const standin::UserBoxes::FileQuestion& question, const std::fi
 {
     m_browser.addListener(this);
     m_browser.setFilenameBoxLabel("Name");
+    setColours();
     m_accept.onClick = [this] { accept(); };
     m_cancel.onClick = [this] { cancel(); };
     addAndMakeVisible(m_browser);
@@ -53,6 +55,23 @@ FileBox::FileBox(const standin::UserBoxes::FileQuestion& question, const std::fi
     addAndMakeVisible(m_cancel);
     setPanelSize(Width, Height);
     selectionChanged();
+}
+
+void FileBox::setColours()
+{
+    using Browser = juce::FileBrowserComponent;
+    using List = juce::DirectoryContentsDisplayComponent;
+    using cadrel::gui::Palette;
+    using cadrel::gui::toColour;
+    for (const int background : {Browser::currentPathBoxBackgroundColourId, Browser::filenameBoxBackgroundColourId})
+        m_browser.setColour(background, juce::Colours::black);
+    for (const int text : {Browser::currentPathBoxTextColourId, Browser::filenameBoxTextColourId})
+        m_browser.setColour(text, juce::Colours::white);
+    m_browser.setColour(Browser::currentPathBoxArrowColourId, juce::Colours::black);
+    m_browser.setColour(List::textColourId, toColour(Palette::text));
+    m_browser.setColour(List::highlightedTextColourId, juce::Colours::black);
+    m_browser.setColour(List::highlightColourId, toColour(Palette::selection));
+    m_browser.lookAndFeelChanged();
 }
 
 FileBox::~FileBox()

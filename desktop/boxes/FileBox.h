@@ -39,6 +39,7 @@ private:
     void fileDoubleClicked(const juce::File& file) override;
     void browserRootChanged(const juce::File&) override {}
 
+    void setColours();
     void accept();
     void open();
     void save();

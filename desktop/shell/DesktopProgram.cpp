@@ -2,30 +2,25 @@
 
 #include "desktop/shell/DesktopProgram.h"
 
-#include "desktop/boxes/BoxText.h"
-#include "standin/base/Utf16.h"
+#include "desktop/document/DroppedFile.h"
 #include "standin/edit/ActionManager.h"
-#include "standin/edit/ProjectManager.h"
-#include "standin/file/ProjectFile.h"
-#include "standin/project/Project.h"
 #include "standin/window/ViewManager.h"
 #include "velmark/UserInterface.h"
 
 #include <cstdlib>
 #include <string_view>
+#include <utility>
 
 namespace desktop {
 
 namespace fs = std::filesystem;
 
-using standin::Project;
-using standin::toUtf16;
-using standin::toUtf8;
 using Velmark::IActionManager;
 
 namespace {
 
 constexpr std::string_view ProjectMenu = "Project";
+constexpr std::chrono::seconds LookInterval(2);
 
 fs::path homeFolder()
 {
@@ -38,21 +33,17 @@ fs::path homeFolder()
 } // namespace
 
 DesktopProgram::DesktopProgram(const ModulePlaces& places)
-    : m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos)
+    : m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
+      m_documents(m_application, &m_recent), m_workspace(m_documents, m_boxes)
 {
     MainView& view = m_window.view();
     view.menuState = [this] { return menuState(); };
-    view.onCommand = [this](int command) { choose(command); };
-    view.onTabChosen = [this](std::size_t tab) {
-        m_application.activateProject(m_application.projects().projects()[tab].get());
-    };
-    view.onTabClosed = [this](std::size_t tab) { close(*m_application.projects().projects()[tab]); };
-    view.onFilesDropped = [this](const std::vector<fs::path>& files) {
-        for (const fs::path& file : files)
-            open(file);
-    };
+    view.onCommand = [this](int command) { later([=, this] { choose(command); }); };
+    view.onTabChosen = [this](std::size_t tab) { later([=, this] { m_documents.activate(m_documents.at(tab)); }); };
+    view.onTabClosed = [this](std::size_t tab) { later([=, this] { m_workspace.close(m_documents.at(tab)); }); };
+    view.onFilesDropped = [this](const std::vector<fs::path>& files) { later([=, this] { takeDropped(files); }); };
     view.isBlocked = [this] { return m_boxes.isOpen(); };
-    m_window.onClose = [this] { m_wantsToQuit = true; };
+    m_window.onClose = [this] { later([this] { quit(); }); };
     m_boxes.setOpenChanged([&view](bool isOpen) { view.embedded().setCovered(isOpen); });
     m_application.setBoxes(&m_boxes);
     m_application.views().setWindowSystem(&view.embedded());
@@ -73,157 +64,186 @@ void DesktopProgram::loadModule(const ModulePlaces& places)
     try {
         m_module.emplace(m_application, places.module, places.resources);
     } catch (const standin::ModuleError& error) {
-        tell(std::string("Cadrel can't be loaded: ") + error.what());
+        later([this, reason = std::string(error.what())] { m_workspace.tell("Cadrel can't be loaded: " + reason); });
     }
 }
 
 void DesktopProgram::run(const std::vector<fs::path>& projects)
 {
-    for (const fs::path& project : projects)
-        open(project);
-    refresh();
+    later([=, this] { open(projects); });
     m_loop.runUntil([this] { return m_isDone; });
 }
 
 void DesktopProgram::idle(bool isWaiting)
 {
     // While something waits for the user, the host isn't idle, but views of modules go on working.
-    if (isWaiting) {
+    if (isWaiting || m_boxes.isOpen()) {
         m_application.views().idle();
         return;
     }
+    doActs();
     m_application.idle();
+    const auto now = std::chrono::steady_clock::now();
+    m_documents.idle(now);
+    if (now >= m_nextLook) {
+        m_workspace.lookAtFile();
+        m_nextLook = std::chrono::steady_clock::now() + LookInterval;
+    }
     refresh();
-    if (m_wantsToQuit && !m_boxes.isOpen())
-        m_isDone = true;
+}
+
+void DesktopProgram::doActs()
+{
+    // What comes meanwhile is done in the next idle time.
+    for (const auto& act : std::exchange(m_acts, {}))
+        act();
 }
 
 void DesktopProgram::choose(int command)
 {
-    if (command >= MenuCommand::FirstOfModules && command < MenuCommand::FirstHistory) {
-        const auto commands = moduleCommands();
-        const auto index = static_cast<std::size_t>(command - MenuCommand::FirstOfModules);
-        if (index < commands.size())
-            m_application.choose(*commands[index]);
-        return;
-    }
+    OpenDocument* const active = m_documents.active();
+    const auto invoke = [this](const char* action) {
+        m_application.actions().invoke(IActionManager::EditCategory, action, 0);
+    };
+    if (command >= MenuCommand::FirstRecent)
+        return chooseOfList(command);
     switch (command) {
     case MenuCommand::Open:
-        return chooseProject();
-    case MenuCommand::Close:
-        if (Project* const active = m_application.projects().active())
-            close(*active);
-        return;
+        m_workspace.chooseAndOpen();
+        return showModuleWindow();
     case MenuCommand::Quit:
-        m_wantsToQuit = true;
-        return;
+        return quit();
     case MenuCommand::Undo:
-        m_application.actions().invoke(IActionManager::EditCategory, IActionManager::Undo, 0);
-        return;
+        return invoke(IActionManager::Undo);
     case MenuCommand::Redo:
-        m_application.actions().invoke(IActionManager::EditCategory, IActionManager::Redo, 0);
-        return;
+        return invoke(IActionManager::Redo);
     case MenuCommand::Keys:
         return showKeys();
     case MenuCommand::About:
         return showAbout();
     default:
+        break;
+    }
+    if (!active)
         return;
-    }
+    if (command == MenuCommand::Save)
+        m_workspace.save(*active);
+    else if (command == MenuCommand::SaveAs)
+        m_workspace.saveAs(*active);
+    else if (command == MenuCommand::Close)
+        m_workspace.close(*active);
+    else if (command == MenuCommand::AddVideo)
+        m_workspace.addVideos(*active);
 }
 
-void DesktopProgram::chooseProject()
+void DesktopProgram::chooseOfList(int command)
 {
-    const auto files =
-        m_boxes.chooseFiles({u"Open Project", {{"stage", "Project"}, {"ardour", "Session of Ardour"}}, u"", false});
-    for (const std::u16string& file : files)
-        open(toUtf8(file));
+    const auto indexFrom = [command](int first) { return static_cast<std::size_t>(command - first); };
+    if (command < MenuCommand::FirstOfModules)
+        return openRecent(indexFrom(MenuCommand::FirstRecent));
+    if (command < MenuCommand::FirstHistory)
+        return chooseModuleCommand(indexFrom(MenuCommand::FirstOfModules));
+    if (OpenDocument* const active = m_documents.active())
+        active->goToUndoPosition(indexFrom(MenuCommand::FirstHistory));
 }
 
-void DesktopProgram::open(const fs::path& file)
+void DesktopProgram::chooseModuleCommand(std::size_t index)
 {
-    try {
-        m_application.activateProject(&m_application.openProject(file));
-    } catch (const standin::ProjectFileError& error) {
-        return tell(error.what());
+    const auto commands = moduleCommands();
+    if (index < commands.size())
+        m_application.choose(commands[index]);
+}
+
+void DesktopProgram::openRecent(std::size_t index)
+{
+    const auto entries = m_recent.entries();
+    if (index < entries.size())
+        open({entries[index].path});
+}
+
+void DesktopProgram::takeDropped(const std::vector<fs::path>& files)
+{
+    std::vector<fs::path> projects;
+    for (const fs::path& file : files) {
+        if (droppedFile(file) == DroppedFile::Project)
+            projects.push_back(file);
+        else
+            m_workspace.tell(file.filename().string() + " is no project.");
     }
+    open(projects);
+}
+
+void DesktopProgram::open(const std::vector<fs::path>& files)
+{
+    for (const fs::path& file : files)
+        m_workspace.open(file);
     showModuleWindow();
 }
 
-void DesktopProgram::close(Project& project)
+void DesktopProgram::quit()
 {
-    m_application.closeProject(project);
-    const auto& left = m_application.projects().projects();
-    if (!left.empty() && !m_application.projects().active())
-        m_application.activateProject(left.back().get());
+    m_isDone = m_workspace.closeAll();
 }
 
+/// As soon as there is a project for it.
 void DesktopProgram::showModuleWindow()
 {
-    const auto commands = moduleCommands();
-    if (!commands.empty() && m_application.views().windows().empty())
-        m_application.choose(*commands.front());
+    if (m_documents.size() > 0 && m_application.views().windows().empty())
+        chooseModuleCommand(0);
 }
 
 void DesktopProgram::showKeys()
 {
-    tell("Ctrl+O  opens a project\n"
-         "Ctrl+S, Ctrl+Shift+S  saves it, and saves it as another file\n"
-         "Ctrl+Z, Ctrl+Shift+Z  undo and redo\n"
-         "Ctrl+W, Ctrl+Q  closes the project, and the program\n"
-         "F10  opens the menus");
+    m_workspace.tell("Ctrl+O  opens a project\n"
+                     "Ctrl+S, Ctrl+Shift+S  saves it, and saves it as another file\n"
+                     "Ctrl+Z, Ctrl+Shift+Z  undo and redo\n"
+                     "Ctrl+W, Ctrl+Q  closes the project, and the program\n"
+                     "F10  opens the menus");
 }
 
 void DesktopProgram::showAbout()
 {
-    tell("Cadrel carries the sound of a project over to a new picture cut.\n\n"
-         "GNU General Public License, version 3 or (at your option) any later version");
+    m_workspace.tell("Cadrel carries the sound of a project over to a new picture cut.\n\n"
+                     "GNU General Public License, version 3 or (at your option) any later version");
 }
 
 void DesktopProgram::refresh()
 {
-    const Project* const active = m_application.projects().active();
     std::vector<TabStrip::Tab> tabs;
     std::size_t activeTab = 0;
-    for (const auto& project : m_application.projects().projects()) {
-        if (project.get() == active)
-            activeTab = tabs.size();
-        const fs::path path = toUtf8(project->path());
-        tabs.push_back({path.filename().string(), path.string(), false});
+    std::string title = "Cadrel";
+    for (std::size_t index = 0; index < m_documents.size(); ++index) {
+        const OpenDocument& document = m_documents.at(index);
+        tabs.push_back({document.name(), document.path().string(), document.isUnsaved()});
+        if (&document != m_documents.active())
+            continue;
+        activeTab = index;
+        title = std::string(document.isUnsaved() ? "*" : "").append(document.name()).append(" - Cadrel");
     }
-    const std::string name = tabs.empty() ? "" : tabs[activeTab].name;
-    m_window.setName(juce::String::fromUTF8((name.empty() ? std::string("Cadrel") : name + " - Cadrel").c_str()));
+    m_window.setName(juce::String::fromUTF8(title.c_str()));
     m_window.view().setTabs(std::move(tabs), activeTab);
 }
 
-std::vector<const standin::MenuRegistry::Command*> DesktopProgram::moduleCommands()
+std::vector<standin::MenuRegistry::Command> DesktopProgram::moduleCommands()
 {
-    std::vector<const standin::MenuRegistry::Command*> commands;
-    for (const auto& command : m_application.menus().commands()) {
-        if (command.menu == ProjectMenu)
-            commands.push_back(&command);
-    }
+    std::vector<standin::MenuRegistry::Command> commands = m_application.menus().commands();
+    std::erase_if(commands, [](const auto& command) { return command.menu != ProjectMenu; });
     return commands;
 }
 
 MenuState DesktopProgram::menuState()
 {
     MenuState state;
-    for (const auto* const command : moduleCommands())
-        state.moduleCommands.push_back(command->title);
-    if (const Project* const active = m_application.projects().active()) {
+    for (const auto& command : moduleCommands())
+        state.moduleCommands.push_back(command.title);
+    for (const RecentFiles::Entry& entry : m_recent.entries())
+        state.recentFiles.push_back(entry.path.string());
+    if (const OpenDocument* const active = m_documents.active()) {
         state.hasProject = true;
-        const standin::UndoList& list = const_cast<Project*>(active)->undoList();
-        for (std::size_t index = 0; index < list.size(); ++index)
-            state.undoNames.push_back(list.nameAt(index));
-        state.undoPosition = list.doneCount();
+        state.undoNames = active->undoNames();
+        state.undoPosition = active->undoPosition();
     }
     return state;
-}
-
-void DesktopProgram::tell(const std::string& message)
-{
-    m_boxes.ask(toUtf16(message), {u"OK"});
 }
 
 } // namespace desktop

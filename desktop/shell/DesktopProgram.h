@@ -4,13 +4,18 @@
 
 #include "desktop/boxes/Boxes.h"
 #include "desktop/boxes/EventLoop.h"
+#include "desktop/document/OpenDocuments.h"
+#include "desktop/document/RecentFiles.h"
 #include "desktop/shell/MainWindow.h"
 #include "desktop/shell/ModulePlaces.h"
+#include "desktop/shell/Workspace.h"
 #include "standin/Application.h"
 #include "standin/module/ModuleLoader.h"
 #include "standin/video/Videos.h"
 
+#include <chrono>
 #include <filesystem>
+#include <functional>
 #include <optional>
 #include <vector>
 
@@ -31,17 +36,22 @@ public:
 private:
     void loadModule(const ModulePlaces& places);
     void idle(bool isWaiting);
+    /// Does it in the next idle time, out of the calls of JUCE, so that a box may wait in it.
+    void later(std::function<void()> act) { m_acts.push_back(std::move(act)); }
+    void doActs();
     void choose(int command);
-    void chooseProject();
-    void open(const std::filesystem::path& file);
-    void close(standin::Project& project);
+    void chooseOfList(int command);
+    void chooseModuleCommand(std::size_t index);
+    void openRecent(std::size_t index);
+    void takeDropped(const std::vector<std::filesystem::path>& files);
+    void open(const std::vector<std::filesystem::path>& files);
+    void quit();
     void showModuleWindow();
     void showKeys();
     void showAbout();
     void refresh();
-    std::vector<const standin::MenuRegistry::Command*> moduleCommands();
+    std::vector<standin::MenuRegistry::Command> moduleCommands();
     MenuState menuState();
-    void tell(const std::string& message);
 
     EventLoop m_loop;
     standin::Videos m_videos;
@@ -49,7 +59,11 @@ private:
     Boxes m_boxes;
     standin::Application m_application;
     std::optional<standin::ModuleLoader> m_module;
-    bool m_wantsToQuit = false;
+    RecentFiles m_recent;
+    OpenDocuments m_documents;
+    Workspace m_workspace;
+    std::vector<std::function<void()>> m_acts;
+    std::chrono::steady_clock::time_point m_nextLook{};
     bool m_isDone = false;
 };
 

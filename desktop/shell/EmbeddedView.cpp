@@ -32,6 +32,21 @@ juce::Image imageOf(const XContainer::Picture& picture)
     return image;
 }
 
+juce::KeyPress keyPressOf(const XContainer::Key& key)
+{
+    // The codes of JUCE's keys end as their symbols do; those that move something have a mark.
+    constexpr unsigned long FirstNamed = 0xff00;
+    constexpr unsigned long FirstMoving = 0xff50;
+    constexpr int MovingMark = 0x10000000;
+    const juce::ModifierKeys modifiers((key.hasShift ? juce::ModifierKeys::shiftModifier : 0) |
+                                       (key.hasControl ? juce::ModifierKeys::ctrlModifier : 0) |
+                                       (key.hasAlt ? juce::ModifierKeys::altModifier : 0));
+    const int code = key.symbol >= FirstNamed
+                         ? static_cast<int>(key.symbol & 0xff) | (key.symbol >= FirstMoving ? MovingMark : 0)
+                         : static_cast<int>(key.symbol);
+    return {code, modifiers, static_cast<juce::juce_wchar>(key.hasControl ? '\0' : key.character)};
+}
+
 } // namespace
 
 class EmbeddedView::Window : public standin::NativeWindow {
@@ -40,6 +55,7 @@ public:
         : m_owner(owner), m_listener(listener), m_container(around)
     {
         m_owner.m_window = this;
+        m_container.onKey = [this](const XContainer::Key& key) { m_owner.pass(key); };
         juce::LinuxEventLoop::registerFdCallback(m_container.descriptor(), [this](int) { m_container.serve(); });
     }
     ~Window() override
@@ -140,6 +156,12 @@ void EmbeddedView::giveKeyboardAway()
 {
     if (m_window && m_window->container().hasKeyboard())
         m_window->container().giveKeyboardAway();
+}
+
+void EmbeddedView::pass(const XContainer::Key& key)
+{
+    if (juce::ComponentPeer* const peer = getPeer(); peer && !m_isCovered)
+        peer->handleKeyPress(keyPressOf(key));
 }
 
 void EmbeddedView::paint(juce::Graphics& graphics)

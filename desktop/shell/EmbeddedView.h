@@ -41,6 +41,8 @@ private:
     /// In physical pixels of the window around it.
     XContainer::Place place() const;
     void layOut();
+    /// What the module's view hasn't used is ours.
+    void pass(const XContainer::Key& key);
 
     juce::String m_hint;
     Window* m_window = nullptr; ///< not owned

@@ -69,6 +69,7 @@ MainView::MainView()
       })),
       m_embedded("Open a project with Ctrl+O, or drop one here.")
 {
+    m_menuBar.setLookAndFeel(&m_menuBarLook);
     m_tabs.onChosen = [this](std::size_t tab) {
         if (onTabChosen)
             onTabChosen(tab);
@@ -89,6 +90,7 @@ MainView::MainView()
 MainView::~MainView()
 {
     m_menuBar.setModel(nullptr);
+    m_menuBar.setLookAndFeel(nullptr);
 }
 
 void MainView::setTracks(juce::Component* tracks)
@@ -156,7 +158,9 @@ juce::StringArray MainView::getMenuBarNames()
 juce::PopupMenu MainView::getMenuForIndex(int index, const juce::String& /*name*/)
 {
     const std::vector<MenuItem> menus = menusOf(menuState ? menuState() : MenuState());
-    return menuOf(menus[static_cast<std::size_t>(index)].items);
+    juce::PopupMenu menu = menuOf(menus[static_cast<std::size_t>(index)].items);
+    menu.setLookAndFeel(&*m_look);
+    return menu;
 }
 
 void MainView::menuItemSelected(int command, int /*index*/)

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "desktop/shell/EmbeddedView.h"
+#include "desktop/shell/MenuBarLook.h"
 #include "desktop/shell/Menus.h"
 #include "desktop/shell/TabStrip.h"
 #include "gui/look/LookAndFeel.h"
@@ -63,6 +64,7 @@ private:
 
     juce::SharedResourcePointer<cadrel::gui::LookAndFeel> m_look;
     juce::Component m_desk;
+    MenuBarLook m_menuBarLook;
     juce::MenuBarComponent m_menuBar;
     TabStrip m_tabs;
     std::unique_ptr<Divider> m_divider;

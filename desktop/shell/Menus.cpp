@@ -79,6 +79,8 @@ MenuItem projectMenu(const MenuState& state)
     for (std::size_t index = 0; index < state.moduleCommands.size(); ++index)
         menu.items.push_back({MenuCommand::FirstOfModules + static_cast<int>(index),
                               standin::toUtf8(state.moduleCommands[index]), "", state.hasProject});
+    menu.items.push_back(line());
+    menu.items.push_back({MenuCommand::AddVideo, "Add Video...", "", state.hasProject});
     return menu;
 }
 

@@ -21,6 +21,7 @@ struct MenuCommand {
         PreviewPlace,
         Ghosts,
         FitAll,
+        AddVideo,
         Keys,
         About,
     };
@@ -43,7 +44,6 @@ struct MenuItem {
 /// What the menus show.
 struct MenuState {
     bool hasProject = false;
-    bool isUnsaved = false;
     std::vector<std::string> recentFiles; ///< the latest first
     std::vector<std::u16string> undoNames;
     std::size_t undoPosition = 0;

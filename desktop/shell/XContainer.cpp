@@ -30,6 +30,22 @@ bool isWithin(Display* display, Window window, Window container)
     return window == container;
 }
 
+XContainer::Key keyOf(XKeyEvent event)
+{
+    XContainer::Key key;
+    key.hasShift = (event.state & ShiftMask) != 0;
+    key.hasControl = (event.state & ControlMask) != 0;
+    key.hasAlt = (event.state & Mod1Mask) != 0;
+    key.symbol = XLookupKeysym(&event, 0);
+    event.state &= ~static_cast<unsigned>(ControlMask);
+    char text[8] = {};
+    KeySym ignored = NoSymbol;
+    const bool isPrintable =
+        XLookupString(&event, text, sizeof text, &ignored, nullptr) == 1 && text[0] >= ' ' && text[0] <= '~';
+    key.character = isPrintable ? text[0] : '\0';
+    return key;
+}
+
 } // namespace
 
 XContainer::XContainer(Window around) : m_around(around)
@@ -38,7 +54,7 @@ XContainer::XContainer(Window around) : m_around(around)
     if (!display || around == 0)
         return;
     m_window = XCreateSimpleWindow(display, around, 0, 0, 1, 1, 0, 0, Background);
-    XSelectInput(display, m_window, KeyPressMask | KeyReleaseMask);
+    XSelectInput(display, m_window, KeyPressMask);
     XSync(display, False);
 }
 
@@ -65,12 +81,8 @@ void XContainer::serve()
         XNextEvent(display, &event);
         if (event.type == MappingNotify)
             XRefreshKeyboardMapping(&event.xmapping);
-        if (event.type != KeyPress && event.type != KeyRelease)
-            continue;
-        event.xkey.window = m_around;
-        event.xkey.subwindow = None;
-        XSendEvent(display, m_around, True, event.type == KeyPress ? KeyPressMask : KeyReleaseMask, &event);
-        XFlush(display);
+        if (event.type == KeyPress && onKey)
+            onKey(keyOf(event.xkey));
     }
 }
 

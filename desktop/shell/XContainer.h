@@ -5,13 +5,14 @@
 #include "host/plugin/XConnection.h"
 
 #include <cstdint>
+#include <functional>
 #include <optional>
 #include <vector>
 
 namespace desktop {
 
-/// A window of ours inside another one, for the view of a module. It has a connection of its own to the X server. Keys that the
-/// view sends on to it go to the window around it. Places and sizes are physical pixels.
+/// A window of ours inside another one, for the view of a module. It has a connection of its own to the X server. Places and sizes
+/// are physical pixels.
 class XContainer {
 public:
     using Window = cadrel::host::XConnection::Window;
@@ -30,6 +31,16 @@ public:
         int height = 0;
         std::vector<std::uint32_t> pixels;
     };
+
+    /// A key that the view hasn't used, by the symbol that it has without Shift and Control.
+    struct Key {
+        unsigned long symbol = 0;
+        char character = 0; ///< of ASCII; 0 for none
+        bool hasShift = false;
+        bool hasControl = false;
+        bool hasAlt = false;
+    };
+    std::function<void(const Key& key)> onKey;
 
     /// Not yet visible.
     explicit XContainer(Window around);
