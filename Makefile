@@ -18,7 +18,7 @@ FUZZ_SECONDS ?= 20
 
 sources = $(shell find src standin app desktop examples tests bench fuzz -name '*.cpp' -o -name '*.h')
 reel3 = examples/reel3
-picture_tests = cadrel_gui_window_tests
+picture_tests = cadrel_gui_window_tests cadrel_desktop_tracks_tests
 
 .PHONY: run window test build bench videos fuzz pictures docs-pictures format check-format clean
 

@@ -54,6 +54,8 @@ DesktopProgram::DesktopProgram(const ModulePlaces& places)
 DesktopProgram::~DesktopProgram()
 {
     m_loop.setIdle({});
+    m_window.view().setTracks(nullptr);
+    m_tracks.clear();
     m_module.reset();
     m_application.views().setWindowSystem(nullptr);
     m_application.setBoxes(nullptr);
@@ -90,6 +92,7 @@ void DesktopProgram::idle(bool isWaiting)
         m_nextLook = std::chrono::steady_clock::now() + LookInterval;
     }
     refresh();
+    refreshTracks();
 }
 
 void DesktopProgram::doActs()
@@ -134,6 +137,18 @@ void DesktopProgram::choose(int command)
         m_workspace.close(*active);
     else if (command == MenuCommand::AddVideo)
         m_workspace.addVideos(*active);
+    else if (TracksView* const view = tracks())
+        chooseView(command, *view);
+}
+
+void DesktopProgram::chooseView(int command, TracksView& view)
+{
+    if (command == MenuCommand::FitAll)
+        view.fitAll();
+    else if (command == MenuCommand::PreviewPlace)
+        view.showPreviewPlace();
+    else if (command == MenuCommand::Ghosts)
+        view.setGhosts(!view.showsGhosts());
 }
 
 void DesktopProgram::chooseOfList(int command)
@@ -198,7 +213,12 @@ void DesktopProgram::showKeys()
                      "Ctrl+S, Ctrl+Shift+S  saves it, and saves it as another file\n"
                      "Ctrl+Z, Ctrl+Shift+Z  undo and redo\n"
                      "Ctrl+W, Ctrl+Q  closes the project, and the program\n"
-                     "F10  opens the menus");
+                     "F10  opens the menus\n\n"
+                     "F  shows all of the programme\n"
+                     "P  goes to the preview and back\n"
+                     "G  shows where the clips stood before\n"
+                     "Ctrl with the wheel, + and -  closer and further\n"
+                     "Shift with the wheel, Left and Right  back and on");
 }
 
 void DesktopProgram::showAbout()
@@ -224,6 +244,36 @@ void DesktopProgram::refresh()
     m_window.view().setTabs(std::move(tabs), activeTab);
 }
 
+void DesktopProgram::refreshTracks()
+{
+    OpenDocument* const active = m_documents.active();
+    m_window.view().setTracks(tracks());
+    // A document that was loaded anew may have the place of the one before in memory, but not its project.
+    std::erase_if(m_tracks, [this](const auto& entry) {
+        for (std::size_t index = 0; index < m_documents.size(); ++index) {
+            if (&m_documents.at(index) == entry.first && &entry.first->project() == &entry.second->project())
+                return false;
+        }
+        return true;
+    });
+    if (!active)
+        return;
+    auto& shown = m_tracks[active];
+    if (!shown) {
+        shown = std::make_unique<ProjectTracks>(m_application, active->project(), nullptr);
+        m_window.view().setTracks(&shown->view());
+    }
+    shown->idle();
+}
+
+TracksView* DesktopProgram::tracks()
+{
+    OpenDocument* const active = m_documents.active();
+    const auto found = m_tracks.find(active);
+    const bool isThere = active && found != m_tracks.end() && &found->second->project() == &active->project();
+    return isThere ? &found->second->view() : nullptr;
+}
+
 std::vector<standin::MenuRegistry::Command> DesktopProgram::moduleCommands()
 {
     std::vector<standin::MenuRegistry::Command> commands = m_application.menus().commands();
@@ -243,6 +293,8 @@ MenuState DesktopProgram::menuState()
         state.undoNames = active->undoNames();
         state.undoPosition = active->undoPosition();
     }
+    if (const TracksView* const view = tracks())
+        state.showsGhosts = view->showsGhosts();
     return state;
 }
 

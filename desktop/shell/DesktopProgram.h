@@ -8,6 +8,7 @@
 #include "desktop/document/RecentFiles.h"
 #include "desktop/shell/MainWindow.h"
 #include "desktop/shell/ModulePlaces.h"
+#include "desktop/shell/ProjectTracks.h"
 #include "desktop/shell/Workspace.h"
 #include "standin/Application.h"
 #include "standin/module/ModuleLoader.h"
@@ -16,6 +17,8 @@
 #include <chrono>
 #include <filesystem>
 #include <functional>
+#include <map>
+#include <memory>
 #include <optional>
 #include <vector>
 
@@ -41,6 +44,7 @@ private:
     void doActs();
     void choose(int command);
     void chooseOfList(int command);
+    void chooseView(int command, TracksView& view);
     void chooseModuleCommand(std::size_t index);
     void openRecent(std::size_t index);
     void takeDropped(const std::vector<std::filesystem::path>& files);
@@ -50,6 +54,9 @@ private:
     void showKeys();
     void showAbout();
     void refresh();
+    /// Gives each document its view and shows that of the active one.
+    void refreshTracks();
+    TracksView* tracks();
     std::vector<standin::MenuRegistry::Command> moduleCommands();
     MenuState menuState();
 
@@ -62,6 +69,7 @@ private:
     RecentFiles m_recent;
     OpenDocuments m_documents;
     Workspace m_workspace;
+    std::map<const OpenDocument*, std::unique_ptr<ProjectTracks>> m_tracks;
     std::vector<std::function<void()>> m_acts;
     std::chrono::steady_clock::time_point m_nextLook{};
     bool m_isDone = false;

@@ -1,0 +1,152 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/tracks/ChangeMap.h"
+
+#include "core/edl/EventBase.h"
+#include "core/edl/EventList.h"
+#include "core/edl/ProgrammePlace.h"
+#include "host/track/CoveredRanges.h"
+#include "standin/base/Times.h"
+
+#include <algorithm>
+#include <cmath>
+#include <limits>
+#include <numeric>
+
+namespace desktop {
+
+using cadrel::core::EventBase;
+using cadrel::core::EventList;
+using cadrel::core::Framerate;
+using standin::SameInstant;
+using Span = ChangeMap::Span;
+
+namespace {
+
+struct Shot {
+    Span place;
+    bool isBlack;
+};
+
+std::vector<Shot> shotsOf(const EventList& cut, const Framerate& framerate, double origin)
+{
+    std::vector<Shot> shots;
+    for (const auto& event : cut.events()) {
+        if (cadrel::core::fillsProgramme(*event, framerate))
+            shots.push_back(
+                {{event->dstIn().toSeconds(framerate) - origin, event->dstOut().toSeconds(framerate) - origin},
+                 cadrel::core::isBlack(*event)});
+    }
+    return shots;
+}
+
+double overlapOf(const Span& a, const Span& b)
+{
+    return std::min(a.end, b.end) - std::max(a.start, b.start);
+}
+
+} // namespace
+
+ChangeMap::ChangeMap(const EventList& change, const EventList& oldCut, const EventList& newCut,
+                     const Framerate& framerate, double origin, State state)
+    : m_state(state)
+{
+    for (std::size_t index = 0; index < change.size(); ++index) {
+        const EventBase& event = change.at(index);
+        if (!event.isValid())
+            continue;
+        const auto span = [&](const auto& in, const auto& out) {
+            return Span{in.toSeconds(framerate) - origin, out.toSeconds(framerate) - origin};
+        };
+        m_stretches.push_back(
+            {index, span(event.srcIn(), event.srcOut()), span(event.dstIn(), event.dstOut()), event.isReversed()});
+    }
+    std::ranges::stable_sort(m_stretches, {}, [](const Stretch& stretch) { return stretch.present.start; });
+    m_formerOrder.resize(m_stretches.size());
+    std::iota(m_formerOrder.begin(), m_formerOrder.end(), std::size_t{0});
+    std::ranges::stable_sort(m_formerOrder, {}, [this](std::size_t at) { return m_stretches[at].former.start; });
+
+    std::vector<Span> present;
+    std::vector<Span> former;
+    for (std::size_t at = 0; at < m_stretches.size(); ++at) {
+        present.push_back(m_stretches[at].present);
+        former.push_back(m_stretches[m_formerOrder[at]].former);
+    }
+
+    if (m_state == State::Carried) {
+        cadrel::host::CoveredRanges covered;
+        for (const Span& span : present)
+            covered.add({span.start, span.end});
+        // Two shots in one dissolve overlap: what is new of both is new once.
+        for (const auto& [place, isBlack] : shotsOf(newCut, framerate, origin)) {
+            if (isBlack)
+                continue;
+            for (const auto& range : covered.add({place.start, place.end}))
+                m_withoutSound.push_back({range.start, range.end});
+        }
+        std::ranges::sort(m_withoutSound, {}, &Span::start);
+    }
+    for (const Shot& shot : shotsOf(m_state == State::Carried ? newCut : oldCut, framerate, origin))
+        m_cuts.push_back(shot.place.start);
+    std::ranges::sort(m_cuts);
+    m_cuts.erase(std::unique(m_cuts.begin(), m_cuts.end()), m_cuts.end());
+    m_byPresent = SpanIndex(std::move(present));
+    m_byFormer = SpanIndex(std::move(former));
+}
+
+std::optional<std::size_t> ChangeMap::eventOf(const Span& stretch, State programme) const
+{
+    const SpanIndex& index = programme == State::Carried ? m_byPresent : m_byFormer;
+    std::optional<std::size_t> found;
+    double most = -std::numeric_limits<double>::infinity();
+    index.visitTouching(stretch.start, stretch.end, [&](std::size_t at) {
+        const double overlap = overlapOf(index[at], stretch);
+        // What ends where the stretch begins has nothing of it. A stretch without length lies where the next one begins.
+        const bool isOutside = index[at].end - stretch.start < SameInstant || overlap <= most;
+        if (isOutside)
+            return;
+        most = overlap;
+        found = m_stretches[programme == State::Carried ? at : m_formerOrder[at]].event;
+    });
+    return found;
+}
+
+std::optional<Span> ChangeMap::placeOf(std::size_t event) const
+{
+    const auto found = std::ranges::find(m_stretches, event, &Stretch::event);
+    if (found == m_stretches.end())
+        return std::nullopt;
+    return m_state == State::Carried ? found->present : found->former;
+}
+
+std::vector<Span> ChangeMap::formerPlaces(const Span& stretch) const
+{
+    std::vector<Span> places;
+    if (m_state != State::Carried)
+        return places;
+    m_byPresent.visitTouching(stretch.start, stretch.end, [&](std::size_t at) {
+        const auto& [event, former, present, isReversed] = m_stretches[at];
+        const Span piece{std::max(stretch.start, present.start), std::min(stretch.end, present.end)};
+        const bool hasLength = stretch.end - stretch.start >= SameInstant;
+        if (hasLength ? piece.end - piece.start < SameInstant : present.end - piece.start < SameInstant)
+            return;
+        const double speed = (former.end - former.start) / (present.end - present.start);
+        const auto before = [&](double time) {
+            return isReversed ? former.end - (time - present.start) * speed
+                              : former.start + (time - present.start) * speed;
+        };
+        Span place{before(piece.start), before(piece.end)};
+        if (isReversed)
+            std::swap(place.start, place.end);
+        if (std::abs(place.start - piece.start) < SameInstant && std::abs(place.end - piece.end) < SameInstant)
+            return;
+        // Two events may have carried on what one event was.
+        if (!places.empty() && std::abs(places.back().end - place.start) < SameInstant)
+            places.back().end = place.end;
+        else
+            places.push_back(place);
+    });
+    return places;
+}
+
+} // namespace desktop
