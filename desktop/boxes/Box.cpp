@@ -23,13 +23,17 @@ Box::Box(const juce::String& name, const juce::String& title) : Sheet(name), m_t
 
 void Box::paint(juce::Graphics& graphics)
 {
-    Sheet::paint(graphics);
+    // What is beneath may have a sheet of its own, from which the panel has to stand out.
+    graphics.fillAll(juce::Colours::black.withAlpha(0.45F));
+    graphics.setColour(cadrel::gui::toColour(cadrel::gui::Palette::sheet));
+    graphics.fillRect(panel());
+    graphics.setColour(juce::Colours::black);
+    graphics.drawRect(panel());
     const juce::Rectangle<int> title = panel().withHeight(TitleHeight).reduced(Margin, 0);
     cadrel::gui::drawText(graphics, m_title, static_cast<float>(title.getX()), static_cast<float>(title.getY()),
                           static_cast<float>(title.getWidth()), static_cast<float>(title.getHeight()),
                           juce::Justification::centredLeft, cadrel::gui::getFont(TitleFont), juce::Colours::black,
                           true);
-    graphics.setColour(juce::Colours::black);
     graphics.fillRect(title.getX(), title.getBottom() - 1, title.getWidth(), 1);
 }
 

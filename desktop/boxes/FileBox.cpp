@@ -68,9 +68,12 @@ void FileBox::setColours()
     for (const int text : {Browser::currentPathBoxTextColourId, Browser::filenameBoxTextColourId})
         m_browser.setColour(text, juce::Colours::white);
     m_browser.setColour(Browser::currentPathBoxArrowColourId, juce::Colours::black);
-    m_browser.setColour(List::textColourId, toColour(Palette::text));
-    m_browser.setColour(List::highlightedTextColourId, juce::Colours::black);
-    m_browser.setColour(List::highlightColourId, toColour(Palette::selection));
+    // The list looks for its own ones alone.
+    for (juce::Component* const child : m_browser.getChildren()) {
+        child->setColour(List::textColourId, toColour(Palette::text));
+        child->setColour(List::highlightedTextColourId, juce::Colours::black);
+        child->setColour(List::highlightColourId, toColour(Palette::selection));
+    }
     m_browser.lookAndFeelChanged();
 }
 

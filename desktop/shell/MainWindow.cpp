@@ -20,6 +20,8 @@ constexpr int LeastHeight = 560;
 MainWindow::MainWindow()
     : DocumentWindow("Cadrel", cadrel::gui::toColour(cadrel::gui::Palette::panel), allButtons, false)
 {
+    // Or it would take the keyboard from what is in it when the X server says that the window has it.
+    setWantsKeyboardFocus(false);
     setUsingNativeTitleBar(true);
     setContentNonOwned(&m_view, false);
     setResizable(true, false);

@@ -6,6 +6,7 @@
 #include "core/model/ListOfKind.h"
 #include "core/protect/RunRecord.h"
 #include "core/serialize/ByteArchive.h"
+#include "core/time/FramerateProvider.h"
 #include "core/time/Timecode.h"
 #include "desktop/tracks/ProjectClock.h"
 #include "gui/table/EventRows.h"
