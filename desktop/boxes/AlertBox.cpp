@@ -21,7 +21,7 @@ int heightOf(const juce::String& text, int width)
     content.append(text, cadrel::gui::getFont(MessageFont));
     juce::TextLayout layout;
     layout.createLayout(content, static_cast<float>(width));
-    constexpr int Spare = 12;
+    constexpr int Spare = 24;
     return static_cast<int>(std::ceil(layout.getHeight())) + Spare;
 }
 
@@ -52,7 +52,9 @@ AlertBox::AlertBox(const juce::String& title, const juce::String& message, const
         m_buttons.push_back(std::move(button));
     }
     const int width = std::max(Width, buttonsWidth + 2 * Margin);
-    const int textHeight = std::min(heightOf(message, width - 2 * Margin), MostTextHeight);
+    const int wholeHeight = heightOf(message, width - 2 * Margin);
+    const int textHeight = std::min(wholeHeight, MostTextHeight);
+    m_message.setScrollbarsShown(wholeHeight > MostTextHeight);
     constexpr int Title = 40;
     setPanelSize(width, Title + 2 * Margin + textHeight + Margin + ButtonHeight);
 }

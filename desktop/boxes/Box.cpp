@@ -24,7 +24,7 @@ Box::Box(const juce::String& name, const juce::String& title) : Sheet(name), m_t
 void Box::paint(juce::Graphics& graphics)
 {
     // What is beneath may have a sheet of its own, from which the panel has to stand out.
-    graphics.fillAll(juce::Colours::black.withAlpha(0.45F));
+    graphics.fillAll(juce::Colours::black.withAlpha(0.3F));
     graphics.setColour(cadrel::gui::toColour(cadrel::gui::Palette::sheet));
     graphics.fillRect(panel());
     graphics.setColour(juce::Colours::black);

@@ -88,8 +88,9 @@ void Boxes::endProgress()
 
 void Boxes::show(Box& box)
 {
-    if (m_open++ == 0 && m_openChanged)
+    if (m_open.empty() && m_openChanged)
         m_openChanged(true);
+    m_open.push_back(&box);
     box.setBeneath(&m_beneath);
     m_window.addChildComponent(box);
     box.setVisible(true);
@@ -99,7 +100,10 @@ void Boxes::hide(Box& box)
 {
     box.setVisible(false);
     m_window.removeChildComponent(&box);
-    if (--m_open == 0 && m_openChanged)
+    std::erase(m_open, &box);
+    if (!m_open.empty())
+        m_open.back()->takeFocus();
+    else if (m_openChanged)
         m_openChanged(false);
 }
 

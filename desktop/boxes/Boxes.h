@@ -11,6 +11,7 @@
 #include <chrono>
 #include <functional>
 #include <memory>
+#include <vector>
 
 namespace desktop {
 
@@ -25,7 +26,7 @@ public:
     ~Boxes() override;
 
     void setOpenChanged(OpenChanged changed) { m_openChanged = std::move(changed); }
-    bool isOpen() const { return m_open > 0; }
+    bool isOpen() const { return !m_open.empty(); }
 
     std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons) override;
     std::vector<std::u16string> chooseFiles(const FileQuestion& question) override;
@@ -46,7 +47,7 @@ private:
     juce::Component& m_beneath;
     FolderMemory m_folders;
     OpenChanged m_openChanged;
-    int m_open = 0;
+    std::vector<Box*> m_open;                ///< the one in front is the last
     std::unique_ptr<ProgressBox> m_progress; ///< null while none is shown
     Clock::time_point m_progressStart;
     Clock::time_point m_progressServed;

@@ -47,6 +47,7 @@ FileBox::FileBox(const standin::UserBoxes::FileQuestion& question, const std::fi
 {
     m_browser.addListener(this);
     m_browser.setFilenameBoxLabel("Name");
+    findParts();
     setColours();
     m_accept.onClick = [this] { accept(); };
     m_cancel.onClick = [this] { cancel(); };
@@ -88,14 +89,27 @@ void FileBox::cancel()
     setDone();
 }
 
-juce::Component* FileBox::firstFocus()
+/// The browser has no name for them. The only editor that isn't in the box of folders is that of the name.
+void FileBox::findParts()
 {
-    // The name, which is the only editor that isn't in the box of folders.
     for (juce::Component* const child : m_browser.getChildren()) {
-        if (dynamic_cast<juce::TextEditor*>(child))
-            return child;
+        if (auto* const editor = dynamic_cast<juce::TextEditor*>(child))
+            m_name = editor;
+        if (auto* const list = dynamic_cast<juce::DirectoryContentsDisplayComponent*>(child))
+            m_list = list;
     }
-    return nullptr;
+    // A browser of several files shows their names, but lets none be typed.
+    m_name->setReadOnly(false);
+    m_name->onTextChange = [this] { selectionChanged(); };
+    // The box takes Return and Escape, as in its other controls.
+    m_name->onReturnKey = nullptr;
+    m_name->setEscapeAndReturnKeysConsumed(false);
+}
+
+juce::File FileBox::named() const
+{
+    const juce::String name = m_name->getText();
+    return name.isEmpty() ? juce::File() : m_browser.getRoot().getChildFile(name);
 }
 
 void FileBox::layOut()
@@ -117,7 +131,7 @@ bool FileBox::isDirectorySuitable(const juce::File& /*file*/) const
 
 void FileBox::selectionChanged()
 {
-    m_accept.setEnabled(m_isSave || m_browser.currentFileIsValid());
+    m_accept.setEnabled(m_isSave || named().exists() || m_list->getNumSelectedFiles() > 0);
 }
 
 void FileBox::fileDoubleClicked(const juce::File& file)
@@ -137,10 +151,18 @@ void FileBox::accept()
 void FileBox::open()
 {
     m_files.clear();
-    for (int index = 0; index < m_browser.getNumSelectedFiles(); ++index) {
-        const juce::File file = m_browser.getSelectedFile(index);
-        if (file.existsAsFile())
-            m_files.push_back(pathOf(file));
+    const juce::File typed = named();
+    if (typed.isDirectory()) {
+        m_browser.setRoot(typed);
+        return;
+    }
+    if (typed.existsAsFile()) {
+        m_files.push_back(pathOf(typed));
+    } else {
+        for (int index = 0; index < m_list->getNumSelectedFiles(); ++index) {
+            if (const juce::File file = m_list->getSelectedFile(index); file.existsAsFile())
+                m_files.push_back(pathOf(file));
+        }
     }
     if (!m_files.empty())
         setDone();
@@ -148,14 +170,14 @@ void FileBox::open()
 
 void FileBox::save()
 {
-    const juce::File named = m_browser.getSelectedFile(0);
-    if (named == juce::File() || named == m_browser.getRoot())
+    const juce::File typed = named();
+    if (typed == juce::File())
         return;
-    if (named.isDirectory()) {
-        m_browser.setRoot(named);
+    if (typed.isDirectory()) {
+        m_browser.setRoot(typed);
         return;
     }
-    const std::filesystem::path file = withExtension(pathOf(named), m_filters);
+    const std::filesystem::path file = withExtension(pathOf(typed), m_filters);
     const juce::File target = fileOf(file);
     if (target.isDirectory() || !target.getParentDirectory().isDirectory())
         return;

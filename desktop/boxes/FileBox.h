@@ -28,7 +28,7 @@ public:
 private:
     void confirm() override { accept(); }
     void cancel() override;
-    juce::Component* firstFocus() override;
+    juce::Component* firstFocus() override { return m_name; }
     void layOut() override;
 
     bool isFileSuitable(const juce::File& file) const override;
@@ -39,7 +39,9 @@ private:
     void fileDoubleClicked(const juce::File& file) override;
     void browserRootChanged(const juce::File&) override {}
 
+    void findParts();
     void setColours();
+    juce::File named() const;
     void accept();
     void open();
     void save();
@@ -48,6 +50,8 @@ private:
     bool m_isSave;
     AskBack m_askBack;
     juce::FileBrowserComponent m_browser;
+    juce::TextEditor* m_name = nullptr;                        ///< in the browser
+    juce::DirectoryContentsDisplayComponent* m_list = nullptr; ///< in the browser
     juce::TextButton m_accept;
     juce::TextButton m_cancel{"Cancel"};
     std::vector<std::filesystem::path> m_files;

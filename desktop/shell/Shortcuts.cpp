@@ -15,13 +15,21 @@ struct Shortcut {
     char letter;
     bool withShift;
     int command;
+    bool withControl = true;
 };
 
-/// All with Control. The menus show the same.
+/// The menus show the same.
 constexpr Shortcut Shortcuts[] = {
-    {'o', false, MenuCommand::Open},  {'s', false, MenuCommand::Save}, {'s', true, MenuCommand::SaveAs},
-    {'w', false, MenuCommand::Close}, {'q', false, MenuCommand::Quit}, {'z', false, MenuCommand::Undo},
+    {'o', false, MenuCommand::Open},
+    {'s', false, MenuCommand::Save},
+    {'s', true, MenuCommand::SaveAs},
+    {'w', false, MenuCommand::Close},
+    {'q', false, MenuCommand::Quit},
+    {'z', false, MenuCommand::Undo},
     {'z', true, MenuCommand::Redo},
+    {'f', false, MenuCommand::FitAll, false},
+    {'p', false, MenuCommand::PreviewPlace, false},
+    {'g', false, MenuCommand::Ghosts, false},
 };
 
 } // namespace
@@ -29,11 +37,12 @@ constexpr Shortcut Shortcuts[] = {
 int commandOfKey(const juce::KeyPress& key)
 {
     const juce::ModifierKeys modifiers = key.getModifiers();
-    if (!modifiers.isCtrlDown() || modifiers.isAltDown())
+    if (modifiers.isAltDown())
         return 0;
     const auto letter = juce::CharacterFunctions::toLowerCase(static_cast<juce::juce_wchar>(key.getKeyCode()));
     const auto* const found = std::find_if(std::begin(Shortcuts), std::end(Shortcuts), [&](const Shortcut& each) {
-        return letter == static_cast<juce::juce_wchar>(each.letter) && modifiers.isShiftDown() == each.withShift;
+        return letter == static_cast<juce::juce_wchar>(each.letter) && modifiers.isShiftDown() == each.withShift &&
+               modifiers.isCtrlDown() == each.withControl;
     });
     return found == std::end(Shortcuts) ? 0 : found->command;
 }
