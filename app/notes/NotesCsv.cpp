@@ -56,8 +56,7 @@ public:
     std::string rowOf(const NoteEntry& entry, std::size_t reel) const
     {
         const NoteStep& step = *entry.step();
-        const bool isMove = step.action == StepAction::Move;
-        const bool movesReel = step.action == StepAction::MoveReel;
+        const bool hasOrigin = step.action == StepAction::Move || step.action == StepAction::MoveReel;
         const PictureChange& largest = NotesWording::largestChange(entry);
         const core::EventBase* const shot = largest.newShot != nullptr ? largest.newShot : largest.oldShot;
         const auto time = [this](std::int32_t frames) { return frames == 0 ? "" : m_words.plainTimecode(frames); };
@@ -67,10 +66,8 @@ public:
             std::to_string(entry.number),
             std::to_string(reel + 1),
             std::string(wordOf(step.action)),
-            m_words.plainTimecode(notes.timecodeOf(step.place, reel)),
-            isMove      ? m_words.plainTimecode(notes.timecodeOf(step.from, reel))
-            : movesReel ? m_words.plainTimecode(notes.oldTimecode(largest.inOld->start))
-                        : "",
+            m_words.plainTimecode(step.place.timecode()),
+            hasOrigin ? m_words.plainTimecode(step.from.timecode()) : "",
             time(step.removed),
             time(step.inserted.length),
             time(step.moved),
@@ -86,9 +83,9 @@ public:
             largest.inNew ? m_words.plainTimecode(notes.newTimecode(largest.inNew->start)) : "",
             asText(changesOf(step)),
             NotesWording::feet(step.place.frame),
-            isMove || movesReel ? NotesWording::feet(step.from.frame) : "",
+            hasOrigin ? NotesWording::feet(step.from.frame) : "",
             std::to_string(step.place.reel + 1),
-            isMove || movesReel ? std::to_string(step.from.reel + 1) : "",
+            hasOrigin ? std::to_string(step.from.reel + 1) : "",
             m_document.rate,
             source ? source->toString() : ""};
         std::string row;

@@ -152,8 +152,7 @@ public:
 
     void write()
     {
-        const std::string title =
-            "Change notes: " + escaped(m_words.cutName(false)) + " to " + escaped(m_words.cutName(true));
+        const std::string title = "Change notes: " + escaped(m_words.bothCuts());
         m_sink("<!DOCTYPE html>\n<html lang=\"en\">\n<head>\n<meta charset=\"utf-8\">\n"
                "<meta http-equiv=\"Content-Security-Policy\" content=\"default-src 'none'; style-src 'unsafe-inline'; "
                "script-src 'unsafe-inline'\">\n<meta name=\"viewport\" content=\"width=device-width\">\n<title>" +
@@ -422,7 +421,7 @@ private:
     {
         const auto steps = m_document.notes.largestSteps();
         if (steps.empty()) {
-            m_sink("<p>Nothing has changed.</p>\n");
+            m_sink("<p>" + escaped(m_words.nothingHasChanged()) + "</p>\n");
             return;
         }
         m_sink("<h2>The largest changes</h2>\n<ol class=\"largest\">\n");

@@ -242,7 +242,7 @@ private:
         const core::MoveEnd& end = *entry.moveEnd();
         return {{"row", "moved"},
                 {"step", end.step},
-                {"at", placeJson(end.place, end.place.reel)},
+                {"at", placeJson(end.place)},
                 {end.isTarget ? "fromReel" : "toReel", end.otherReel + 1},
                 {"frames", end.move.frames},
                 {"offsetFrames", entry.runningOffset}};
@@ -259,16 +259,10 @@ private:
                  m_document.notes.newTimecode(kept.newStart) - m_document.notes.oldTimecode(kept.oldStart)}};
     }
 
-    /// In a row of a reel.
-    ordered_json placeJson(const core::WorkPlace& place, std::size_t reel) const
-    {
-        return placeAt(place, m_document.notes.timecodeOf(place, reel));
-    }
-
-    ordered_json placeAt(const core::WorkPlace& place, std::int32_t timecode) const
+    ordered_json placeJson(const core::WorkPlace& place) const
     {
         ordered_json json{
-            {"reel", place.reel + 1}, {"timecode", m_words.plainTimecode(timecode)}, {"frame", place.frame}};
+            {"reel", place.reel + 1}, {"timecode", m_words.plainTimecode(place.timecode())}, {"frame", place.frame}};
         if (m_document.layout.showsFeet)
             json["feet"] = NotesWording::feet(place.frame);
         return json;
@@ -280,17 +274,15 @@ private:
         ordered_json json{{"row", "step"},
                           {"number", entry.number},
                           {"action", wordOf(step.action)},
-                          {"at", placeJson(step.place, step.reel())},
+                          {"at", placeJson(step.place)},
                           {"deleteFrames", step.removed},
                           {"insertFrames", step.inserted.length}};
         if (step.inserted.length > 0)
             json["insertFrom"] = m_words.plainTimecode(m_document.notes.newTimecode(step.inserted.start));
-        if (step.action == core::StepAction::Move) {
-            json["from"] = placeJson(step.from, step.reel());
+        if (step.action == core::StepAction::Move || step.action == core::StepAction::MoveReel)
+            json["from"] = placeJson(step.from);
+        if (step.action == core::StepAction::Move)
             json["moveFrames"] = step.moved;
-        }
-        if (step.action == core::StepAction::MoveReel)
-            json["from"] = placeAt(step.from, m_document.notes.oldTimecode(step.changes.front().inOld->start));
         json["lengthChangeFrames"] = entry.lengthChange;
         json["offsetFrames"] = entry.runningOffset;
         json["joinedSteps"] = step.joined;
@@ -299,7 +291,7 @@ private:
         for (const PictureChange& change : step.changes) {
             changes.push_back(changeJson(change));
             if (change.kind == core::ChangeKind::Doubled && doubled < step.doubledFrom.size())
-                changes.back()["standsAt"] = placeJson(step.doubledFrom[doubled++], step.reel());
+                changes.back()["standsAt"] = placeJson(step.doubledFrom[doubled++]);
         }
         json["changes"] = std::move(changes);
         return json;
@@ -328,6 +320,8 @@ private:
             json["oldTransition"] = true;
         if (change.hasNewTransition)
             json["newTransition"] = true;
+        if (change.isOutOfTheWay)
+            json["outOfTheWay"] = true;
         return json;
     }
 

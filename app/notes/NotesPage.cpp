@@ -23,6 +23,7 @@ p { margin: 0 0 12px; overflow-wrap: anywhere; } .dim { color: var(--dim); } .ti
 .strip { background: var(--card); border: 1px solid var(--line); border-radius: 6px; padding: 10px 14px; }
 .strip div { display: flex; justify-content: space-between; gap: 16px; font-size: 13px; color: var(--dim); }
 .strip .tc, td.tc { font-family: ui-monospace, monospace; font-variant-numeric: tabular-nums; white-space: nowrap; }
+.steps td:nth-child(3) { white-space: normal; }
 .strip .reels { position: relative; display: block; height: 15px; overflow: hidden; font-size: 11px; }
 .reels b { position: absolute; padding-left: 3px; font-weight: 500; }
 svg { display: block; width: 100%; height: 190px; margin: 4px 0; cursor: pointer; }
@@ -42,6 +43,7 @@ svg [data-rows]:hover { fill-opacity: .95; } svg .off { display: none; }
 .tools i { width: 11px; height: 11px; border-radius: 3px; background: var(--hue); }
 .tools button { font: inherit; padding: 2px 10px; background: var(--card); color: inherit; border: 1px solid var(--line);
   border-radius: 5px; }
+ol.largest li { break-inside: avoid; }
 .wide { overflow-x: auto; } table { width: 100%; border-collapse: collapse; margin-top: 10px; }
 .steps { table-layout: fixed; min-width: 780px; } .steps th:nth-child(1) { width: 52px; } .steps th:nth-child(2) { width: 108px; }
 .steps th:nth-child(3) { width: 300px; } .steps th:nth-child(5), .steps th:nth-child(6) { width: 118px; }
@@ -64,21 +66,25 @@ ol.largest { columns: 2; column-gap: 40px; padding-left: 24px; margin: 8px 0; fo
 ol.largest a { color: inherit; }
 [hidden] { display: none !important; }
 @media screen and (max-width: 1040px) { .steps { min-width: 0; } .steps th:nth-child(1) { width: 44px; }
-  .steps th:nth-child(3) { width: 184px; } .steps td:nth-child(3) { white-space: normal; }
+  .steps th:nth-child(3) { width: 184px; }
   .steps th:nth-child(5), .steps th:nth-child(6) { width: 112px; } .steps td, .steps th { padding-left: 6px; padding-right: 6px; } }
 @media screen and (max-width: 760px) { body { padding: 12px; } ol.largest { columns: 1; } td, th { padding-left: 4px; padding-right: 4px; } }
 @media screen and (max-width: 900px) { .steps, .steps tbody { display: block; } .steps thead { display: none; }
   .steps tr { display: grid; grid-template-columns: 34px 106px 1fr auto auto; column-gap: 14px; padding: 6px 0; border-bottom: 1px solid var(--line); }
   .steps td, .steps tr.k td { padding: 0; border: 0; } .steps td:nth-child(5) { grid-area: 1 / 4; } .steps td:nth-child(6) { grid-area: 1 / 5; }
-  .steps td:nth-child(4) { grid-column: 3 / 6; } }
+  .steps td:nth-child(4) { grid-column: 3 / 6; }
+  .steps td:nth-child(5):not(:empty)::before { content: "length "; } .steps td:nth-child(6):not(:empty)::before { content: "offset "; }
+  .steps td.num::before { font: 12px system-ui, sans-serif; color: var(--dim); } }
 @media screen and (max-width: 600px) { .steps tr { grid-template-columns: 28px 1fr auto auto; column-gap: 10px; }
+  .steps td.num::before { display: block; }
   .steps td:nth-child(5) { grid-area: 1 / 3; } .steps td:nth-child(6) { grid-area: 1 / 4; }
   .steps td:nth-child(3), .steps td:nth-child(4) { grid-column: 2 / 5; } }
 @media print { :root { color-scheme: light; --paper: #fff; --card: #fff; } .wide { overflow: visible; } body { padding: 0; font-size: 10pt; }
   .tools { margin: 4px 0; font-size: 8pt; } .tools button, .tools span, .tools input, .tools label:has(input:not(:checked)) { display: none; }
-  * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } h2, h2 + p, thead { break-after: avoid; }
+  * { print-color-adjust: exact; -webkit-print-color-adjust: exact; } tr { break-inside: avoid; } tr:has(details.sound) { break-inside: auto; }
+  tr:has(details.sound) :is(p, li, summary) { break-inside: avoid; } details.sound summary, .change:has(+ details.sound) { break-after: avoid; } h2, h2 + p, thead { break-after: avoid; }
   .steps { min-width: 0; } .steps th:nth-child(1) { width: 40px; } .steps th:nth-child(2) { width: 84px; }
-  .steps th:nth-child(3) { width: 150px; } .steps td:nth-child(3) { white-space: normal; }
+  .steps th:nth-child(3) { width: 150px; }
   .steps th:nth-child(5), .steps th:nth-child(6) { width: 88px; }
   svg { height: 150px; } table { font-size: 9pt; } td, th { padding: 2px 5px; } th { font-size: 8pt; } td.tc { font-size: 8pt; }
   tr.k td { font-size: 7.5pt; } .tag { font-size: 7.5pt; } ol.largest, details.sound { font-size: 8pt; } details.sound .tc { font-size: 7.5pt; }

@@ -352,7 +352,7 @@ private:
     {
         const auto steps = m_document.notes.largestSteps();
         if (steps.empty()) {
-            addText("Nothing has changed.", BodyFont, Ink, 16);
+            addText(m_words.nothingHasChanged(), BodyFont, Ink, 16);
             return;
         }
         addText("The largest changes", HeadingFont, Ink, 24, true);
@@ -561,8 +561,7 @@ private:
     void drawPages()
     {
         const std::vector<std::size_t> ends = pageEnds();
-        const std::string cuts =
-            toPrintable(concatenated({m_words.cutName(false), " to ", m_words.cutName(true)})).text;
+        const std::string cuts = m_words.bothCuts();
         std::size_t piece = 0;
         for (std::size_t page = 0; page < ends.size(); ++page) {
             double top = Margin;

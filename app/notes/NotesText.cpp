@@ -161,7 +161,7 @@ private:
     {
         const auto steps = m_document.notes.largestSteps();
         if (steps.empty())
-            return "\nNothing has changed.\n";
+            return "\n" + m_words.nothingHasChanged() + "\n";
         std::string text = "\nThe largest changes\n";
         for (const NoteEntry* const entry : steps) {
             text += trimmedEnd(padded(numberText(entry->number), Indent.size()) +

@@ -191,20 +191,20 @@ std::string NotesWording::feet(std::int32_t frames)
 
 std::string NotesWording::timeOf(const NoteEntry& entry, std::size_t reel) const
 {
-    const auto& notes = m_document.notes;
-    if (entry.step() != nullptr && entry.step()->action == StepAction::MoveReel)
-        return timecode(notes.oldTimecode(entry.step()->changes.front().inOld->start));
-    return timecode(notes.timecodeOf(placeOf(entry, reel), reel));
+    return timecode(placeOf(entry, reel).timecode());
 }
 
 WorkPlace NotesWording::placeOf(const NoteEntry& entry, std::size_t reel) const
 {
-    if (const core::KeptStretch* const kept = entry.kept())
-        return {reel,
-                kept->newStart - m_document.notes.newCut().reels()[*m_document.notes.reels()[reel].pair.newReel].start};
+    if (const core::KeptStretch* const kept = entry.kept()) {
+        const core::Reel& newReel = m_document.notes.newCut().reels()[*m_document.notes.reels()[reel].pair.newReel];
+        return {reel, kept->newStart - newReel.start, newReel.timecodeStart};
+    }
     if (const core::MoveEnd* const end = entry.moveEnd())
         return end->place;
     const NoteStep& step = *entry.step();
+    if (step.action == StepAction::MoveReel)
+        return step.from;
     const bool goesFurtherOn =
         step.action == StepAction::Move &&
         (step.place.reel != reel || (step.from.reel == reel && step.from.frame < step.place.frame));
@@ -225,11 +225,10 @@ std::string NotesWording::action(const NoteEntry& entry) const
         const bool goesFurtherOn =
             step.from.reel == step.place.reel ? step.from.frame < step.place.frame : entry.lengthChange < 0;
         const WorkPlace& other = goesFurtherOn ? step.place : step.from;
-        return "move " + timecode(step.moved) + (goesFurtherOn ? " to " : " from ") +
-               timecode(m_document.notes.timecodeOf(other, step.reel()));
+        return "move " + timecode(step.moved) + (goesFurtherOn ? " to " : " from ") + timecode(other.timecode());
     }
     case StepAction::MoveReel:
-        return "move the whole reel to " + timecode(m_document.notes.newTimecode(step.changes.front().inNew->start));
+        return concatenated({"move ", wholeReel(step), " to ", timecode(step.place.timecode())});
     case StepAction::Relabel:
         return "new version, " + timecode(step.inserted.length);
     case StepAction::Replace:
@@ -252,6 +251,13 @@ const PictureChange& NotesWording::largestChange(const NoteEntry& entry)
     };
     return *std::max_element(changes.begin(), changes.end(),
                              [&](const PictureChange& a, const PictureChange& b) { return extentOf(a) < extentOf(b); });
+}
+
+/// A step that moves a reel may stand among those of another.
+std::string NotesWording::wholeReel(const NoteStep& step) const
+{
+    return m_document.notes.reels().size() == 1 ? std::string("the whole reel")
+                                                : "all of reel " + std::to_string(step.place.reel + 1);
 }
 
 std::string NotesWording::inFeet(const NoteEntry& entry) const
@@ -406,7 +412,8 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
                 toPrintable(versionName(change.newShot), MostCharactersOfAName).text,
                 {}};
     case ChangeKind::ReelMoved:
-        return {length + (change.frames < 0 ? " earlier" : " later"), "the whole reel", {}};
+        return {length + (change.frames < 0 ? " earlier" : " later"), "the whole reel",
+                change.isOutOfTheWay ? "out of the way until its own steps" : ""};
     case ChangeKind::TransitionRemoved:
         return {transitionText(change), nameOf(change.oldShot), {}};
     case ChangeKind::TransitionAdded:
@@ -428,7 +435,11 @@ std::string NotesWording::reelTitle(std::size_t reel) const
     if (!pair.oldReel)
         return title + ", is new";
     const std::int32_t oldStart = notes.oldCut().reels()[*pair.oldReel].timecodeStart;
-    return oldStart == start ? title : title + ", began at " + timecode(oldStart);
+    if (oldStart == start)
+        return title;
+    const std::size_t movedBy = notes.reels()[reel].movedBy;
+    return concatenated({title, ", began at ", timecode(oldStart),
+                         movedBy == 0 ? std::string() : ", moved by step " + std::to_string(movedBy)});
 }
 
 std::string NotesWording::reelStart(std::size_t reel) const
@@ -552,6 +563,10 @@ std::string NotesWording::order() const
             "taken out first; the place after \"to\" is counted without it.");
         if (m_document.notes.reels().size() > 1)
             say("What is put into a reel or taken out of it leaves the starts of the others where they are.");
+        if (m_document.notes.reels().size() > 1 && movesReels())
+            say("Reels are moved as a whole in such an order that none ever lies on another, also where all of them "
+                "are on "
+                "one timeline.");
         say("In the lines below a step, \"at\" is a place in the old cut. The offset of a step is what the reel has "
             "gained so far; that of kept picture is how much later it stands now than in the old cut.");
         if (m_document.layout.showsFeet)
@@ -592,6 +607,51 @@ std::string NotesWording::titles() const
     if (m_document.cuts.oldTitles.empty() && m_document.cuts.newTitles.empty())
         return {};
     return concatenated({cutTitle(false), " to ", cutTitle(true)});
+}
+
+std::string NotesWording::bothCuts() const
+{
+    const std::string was = cutTitle(false);
+    const std::string is = cutTitle(true);
+    if (was != is)
+        return concatenated({was, " to ", is});
+    return toPrintable(concatenated({cutName(false), " to ", cutName(true)})).text;
+}
+
+std::string NotesWording::nothingHasChanged() const
+{
+    return passedOver(false) == passedOver(true) ? "Nothing has changed."
+                                                 : "Nothing has changed in what could be read; see below.";
+}
+
+/// The lines of a cut that have no picture or no place that can be read, and those that were not read.
+std::multiset<std::string> NotesWording::passedOver(bool isNew) const
+{
+    std::multiset<std::string> lines;
+    const core::Programme& cut = isNew ? m_document.notes.newCut() : m_document.notes.oldCut();
+    for (const core::DoubtfulEvent& doubtful : cut.doubts()) {
+        if (doubtful.doubt != PictureDoubt::NoPicture)
+            continue;
+        const EventBase& event = cut.events().at(static_cast<std::size_t>(doubtful.event));
+        lines.insert(concatenated({event.rollName(), "\n", event.clipName(), "\n", event.srcIn().toString(),
+                                   event.srcOut().toString(), event.dstIn().toString(), event.dstOut().toString()}));
+    }
+    for (const auto& [file, unreadLines] : isNew ? m_document.cuts.newUnread : m_document.cuts.oldUnread) {
+        for (const auto& [line, problem] : unreadLines)
+            lines.insert(line.text);
+    }
+    return lines;
+}
+
+bool NotesWording::movesReels() const
+{
+    const auto movesReel = [](const NoteEntry& entry) {
+        return entry.step() != nullptr && entry.step()->action == StepAction::MoveReel;
+    };
+    const auto& reels = m_document.notes.reels();
+    return std::any_of(reels.begin(), reels.end(), [&](const core::ReelNotes& reel) {
+        return std::any_of(reel.entries.begin(), reel.entries.end(), movesReel);
+    });
 }
 
 bool NotesWording::hasSteps() const

@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <initializer_list>
+#include <set>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -47,9 +48,10 @@ public:
     /// 35 mm feet and frames, 16 frames a foot: "12+05". The first frame of a reel is 0+00.
     static std::string feet(std::int32_t frames);
 
-    /// The timecode of `placeOf`; of a step that moves its reel where the reel began.
+    /// The timecode of `placeOf`.
     std::string timeOf(const core::NoteEntry& entry, std::size_t reel) const;
-    /// Where a row stands in the programme as it is then. Of a move to further on it is where the picture is taken from.
+    /// Where a row stands in the programme as it is then. Of a move to further on it is where the picture is taken from, and
+    /// of a reel that is moved as a whole where it began until then.
     core::WorkPlace placeOf(const core::NoteEntry& entry, std::size_t reel) const;
     /// "delete 00:00:01:00"; at the other end of a move "moved 00:00:30:00 to reel 8, step 40".
     std::string action(const core::NoteEntry& entry) const;
@@ -71,12 +73,16 @@ public:
     std::string cutTitle(bool isNew) const;
     /// "REEL 3 V07 to REEL 3 V12"; empty where no file has a title.
     std::string titles() const;
+    /// "REEL 3 V07 to REEL 3 V12", or the names of the files where the titles don't tell the cuts apart.
+    std::string bothCuts() const;
     /// The names of the files of a cut; of many the first and the last.
     std::string cutName(bool isNew) const;
     /// How many steps a reel has.
     std::size_t stepsOf(std::size_t reel) const;
     /// The shot of the largest change of a step, and how many more shots it changes: "42A-3 MAREN MCU and 2 more".
     std::string shotsOf(const core::NoteEntry& entry) const;
+    /// Where there are no steps. Also whether anything was passed over in one of the cuts alone.
+    std::string nothingHasChanged() const;
     /// How the steps and the lines below them are meant; empty where nothing needs to be explained.
     std::string order() const;
     /// The settings in force, a line for each place that they are from: "Settings given: --simplify 12".
@@ -100,7 +106,10 @@ private:
     std::string speedText(const core::EventBase& was, const core::EventBase& now) const;
     std::string ownSpeedText(const core::EventBase* shot) const;
     std::string formerVersion(const core::PictureChange& change) const;
+    std::string wholeReel(const core::NoteStep& step) const;
+    std::multiset<std::string> passedOver(bool isNew) const;
     bool hasSteps() const;
+    bool movesReels() const;
     /// The name of a file; with its cut where both have a file of that name.
     std::string fileOf(const std::string& file, bool isNew) const;
     void addDoubts(bool isNew, std::vector<std::string>& lines) const;

@@ -53,20 +53,24 @@ std::string projectFileIn(const std::string& path)
     try {
         return standin::ProjectFile::fileIn(path).string();
     } catch (const ProjectFileError& error) {
-        throw Failure{path, faultIn(error, path), "give the project file in it"};
+        throw Failure{path, faultIn(error, path),
+                      error.remedy().empty() ? "give the project file in it" : error.remedy()};
     }
 }
 
 Failure readingFailure(const ProjectFileError& error, const std::string& file)
 {
-    return {file, faultIn(error, file), "take an intact copy, or the version of Cadrel that wrote it"};
+    return {file, faultIn(error, file),
+            error.remedy().empty() ? "take an intact copy, or the version of Cadrel that wrote it" : error.remedy()};
 }
 
 Failure writingFailure(const ProjectFileError& error, const std::string& file)
 {
     const std::string fault = faultIn(error, file);
     // Why a file can't be written the file system tells better.
-    return fault == "can't be written" ? unwritable({file}) : Failure{file, fault, "correct the project"};
+    return fault == "can't be written"
+               ? unwritable({file})
+               : Failure{file, fault, error.remedy().empty() ? "correct the project" : error.remedy()};
 }
 
 ProjectClock clockOf(const standin::Project& project, const std::string& file)

@@ -7,6 +7,7 @@
 #include "core/serialize/ByteArchive.h"
 #include "standin/base/AttributeList.h"
 #include "standin/project/Project.h"
+#include "standin/project/ProjectForm.h"
 #include "velmark/Attributes.h"
 
 #include <cstdint>
@@ -56,6 +57,10 @@ std::uint32_t checksumIn(const standin::Project& project)
 
 StoredModel::StoredModel(const standin::Project& project, const ProjectClock& clock)
 {
+    if (project.form() && project.form()->hasBrokenStorage()) {
+        m_failure = Result::CorruptData;
+        return;
+    }
     const Attribute* const storage = find(project, AttributeKey::Storage);
     if (!storage)
         return;

@@ -168,23 +168,16 @@ void Autosave::remove(const fs::path& project)
         fs::remove(file, error);
 }
 
-fs::path Autosave::keepAside(const fs::path& project)
+void Autosave::keepAside(const fs::path& project)
 {
     const fs::path file = pathFor(project);
     std::error_code error;
-    for (int number = 1;; ++number) {
+    for (int number = 1; isOurs(file); ++number) {
         const fs::path aside = fileBeside(project, "", std::string(".autosave-").append(std::to_string(number)));
-        // A second name never replaces a file that has it.
-        fs::create_hard_link(file, aside, error);
-        if (error == std::errc::file_exists)
+        if (fs::exists(fs::symlink_status(aside, error)))
             continue;
-        if (error && !fs::exists(fs::symlink_status(aside)))
-            fs::rename(file, aside, error);
-        else
-            fs::remove(file, error);
-        if (error)
-            throw DocumentError(file.string() + ": can't be kept under another name");
-        return aside;
+        fs::rename(file, aside, error);
+        return;
     }
 }
 

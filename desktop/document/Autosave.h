@@ -41,8 +41,9 @@ struct Autosave {
                       Time time);
     /// Does nothing where another file has its name.
     static void remove(const std::filesystem::path& project);
-    /// Gives it a name under which nobody looks for it or replaces it; answers that. Throws DocumentError.
-    static std::filesystem::path keepAside(const std::filesystem::path& project);
+    /// Gives it a name under which nobody looks for it or replaces it, `reel3.stage.autosave-1`. Does nothing where there is
+    /// none, and where the disk refuses that.
+    static void keepAside(const std::filesystem::path& project);
 };
 
 } // namespace desktop

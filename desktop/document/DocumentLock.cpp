@@ -52,6 +52,12 @@ void writeHolder(int descriptor)
         return; // on a full disk it is locked all the same; only its holder isn't known
 }
 
+bool isOrdinary(int descriptor)
+{
+    struct stat state {};
+    return ::fstat(descriptor, &state) == 0 && S_ISREG(state.st_mode);
+}
+
 bool isStillAt(int descriptor, const fs::path& path)
 {
     struct stat open {};
@@ -85,6 +91,10 @@ bool DocumentLock::take()
         descriptor = ::open(m_path.c_str(), O_RDONLY | Flags); // another user's
     if (descriptor < 0)
         return true;
+    if (!isOrdinary(descriptor)) {
+        ::close(descriptor);
+        return true;
+    }
     if (::flock(descriptor, LOCK_EX | LOCK_NB) != 0) {
         if (errno == EWOULDBLOCK)
             m_holder = readHolder(descriptor);

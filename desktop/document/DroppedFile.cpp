@@ -36,9 +36,13 @@ bool beginsWithTimecode(std::string_view text)
     return true;
 }
 
-/// An event has four timecodes in a line: source in and out, record in and out.
+/// An event begins with its number and has four timecodes: source in and out, record in and out.
 bool isEvent(std::string_view line)
 {
+    line.remove_prefix(std::min(line.find_first_not_of(" \t"), line.size()));
+    const auto number = static_cast<std::size_t>(std::ranges::find_if_not(line, isDigit) - line.begin());
+    if (number == 0 || number == line.size() || (line[number] != ' ' && line[number] != '\t'))
+        return false;
     int count = 0;
     for (std::size_t index = 0; index < line.size(); ++index) {
         if ((index == 0 || !isDigit(line[index - 1])) && beginsWithTimecode(line.substr(index)))

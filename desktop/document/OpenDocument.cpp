@@ -140,6 +140,8 @@ SaveAnswer OpenDocument::saveAs(const fs::path& path)
     if (m_lock.isHeld())
         Autosave::remove(former);
     m_lock = std::move(lock);
+    if (m_lock.isHeld())
+        Autosave::keepAside(path);
     return answer;
 }
 
@@ -175,6 +177,8 @@ void OpenDocument::idle(Clock::time_point now, Clock::duration interval)
         m_mark.look(now);
         m_lookCost = Clock::now() - start;
         m_lookedAt = now;
+        if (m_lock.holder())
+            retakeLock();
     }
     if (!m_lock.isHeld())
         return;
@@ -183,6 +187,14 @@ void OpenDocument::idle(Clock::time_point now, Clock::duration interval)
     const Clock::duration wait = std::max(interval, AutosaveShare * m_autosaveCost);
     if (m_autosavedVersion != m_mark.version() && (!m_autosavedAt || now - *m_autosavedAt >= wait))
         autosave(now);
+}
+
+/// The other process may have closed the project, or ended and left unsaved work.
+void OpenDocument::retakeLock()
+{
+    m_lock = DocumentLock(path());
+    if (m_lock.isHeld())
+        Autosave::keepAside(path());
 }
 
 void OpenDocument::autosave(Clock::time_point now)

@@ -56,7 +56,7 @@ public:
     const std::filesystem::path& path() const { return m_file.path(); }
     /// Of the file.
     std::string name() const { return path().filename().string(); }
-    /// Whether another process had the project open when it was opened. It is left alone: nothing is written automatically.
+    /// The other process that has the project open. As long as there is one, no autosave is written.
     const std::optional<DocumentLock::Holder>& openElsewhere() const { return m_lock.holder(); }
 
     /// Whether the project would be stored with other bytes than it is. Costs nothing; what a module has changed of its own
@@ -94,6 +94,7 @@ private:
     SaveAnswer write(const std::filesystem::path& path, const std::optional<cadrel::util::FileStamp>& expected);
     /// What there is to do while the user does nothing. Autosaves at most once in `interval`.
     void idle(Clock::time_point now, Clock::duration interval);
+    void retakeLock();
     void autosave(Clock::time_point now);
     void dropAutosave();
     bool isWithinTransaction() const;

@@ -83,10 +83,10 @@ OpenDocument& OpenDocuments::open(const fs::path& path, Work work)
     const fs::path file = projectAt(path);
     if (OpenDocument* const present = find(file)) {
         activate(*present);
-        return *present;
+    } else {
+        m_documents.push_back(openedFrom(file, work));
+        m_active = m_documents.back().get();
     }
-    m_documents.push_back(openedFrom(file, work));
-    m_active = m_documents.back().get();
     if (m_recent)
         m_recent->add(file);
     return *m_active;
@@ -102,10 +102,11 @@ std::unique_ptr<OpenDocument> OpenDocuments::openedFrom(const fs::path& path, Wo
     const bool isWork = kept && ContentPrint::of(kept->content) != file.print();
     if (isWork && work == Work::Recover)
         return newDocument(openProject(path, &kept->content), std::move(file), std::move(lock), true);
+    // First, as the work is all that there is where the file can't be opened.
+    standin::Project& project = openProject(path, nullptr);
     if (isWork && work == Work::Keep)
         Autosave::keepAside(path);
-    standin::Project& project = openProject(path, nullptr);
-    if (kept)
+    else if (kept)
         Autosave::remove(path);
     return newDocument(project, std::move(file), std::move(lock), false);
 }

@@ -24,7 +24,7 @@ namespace fs = std::filesystem;
 namespace {
 
 constexpr std::uintmax_t LargestSize = std::uintmax_t{1} << 20U; // bytes
-constexpr std::size_t Depth = 2;
+constexpr std::size_t Depth = 16;                                // of what is passed over
 constexpr const char* Key = "recent";
 
 /// An absolute path in the environment; the standard for these folders has no others.

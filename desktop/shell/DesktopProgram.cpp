@@ -34,7 +34,7 @@ fs::path homeFolder()
 
 DesktopProgram::DesktopProgram(const ModulePlaces& places)
     : m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
-      m_documents(m_application, &m_recent), m_workspace(m_documents, m_boxes)
+      m_documents(m_application, &m_recent), m_workspace(m_documents, m_boxes), m_stills(m_application.context())
 {
     MainView& view = m_window.view();
     view.menuState = [this] { return menuState(); };
@@ -180,8 +180,11 @@ void DesktopProgram::takeDropped(const std::vector<fs::path>& files)
 {
     std::vector<fs::path> projects;
     for (const fs::path& file : files) {
-        if (droppedFile(file) == DroppedFile::Project)
+        const DroppedFile kind = droppedFile(file);
+        if (kind == DroppedFile::Project)
             projects.push_back(file);
+        else if (kind == DroppedFile::Edl)
+            m_workspace.tell("Add " + file.filename().string() + " with the button + above Old EDL or New EDL.");
         else
             m_workspace.tell(file.filename().string() + " is no project.");
     }
@@ -260,7 +263,7 @@ void DesktopProgram::refreshTracks()
         return;
     auto& shown = m_tracks[active];
     if (!shown) {
-        shown = std::make_unique<ProjectTracks>(m_application, active->project(), nullptr);
+        shown = std::make_unique<ProjectTracks>(m_application, active->project(), &m_stills);
         m_window.view().setTracks(&shown->view());
     }
     shown->idle();

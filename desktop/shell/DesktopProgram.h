@@ -10,6 +10,7 @@
 #include "desktop/shell/ModulePlaces.h"
 #include "desktop/shell/ProjectTracks.h"
 #include "desktop/shell/Workspace.h"
+#include "desktop/tracks/FrameStills.h"
 #include "standin/Application.h"
 #include "standin/module/ModuleLoader.h"
 #include "standin/video/Videos.h"
@@ -69,6 +70,7 @@ private:
     RecentFiles m_recent;
     OpenDocuments m_documents;
     Workspace m_workspace;
+    FrameStills m_stills;
     std::map<const OpenDocument*, std::unique_ptr<ProjectTracks>> m_tracks;
     std::vector<std::function<void()>> m_acts;
     std::chrono::steady_clock::time_point m_nextLook{};

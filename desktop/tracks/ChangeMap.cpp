@@ -40,6 +40,23 @@ std::vector<Shot> shotsOf(const EventList& cut, const Framerate& framerate, doub
     return shots;
 }
 
+std::vector<double> startsOf(const std::vector<Shot>& shots)
+{
+    std::vector<double> starts;
+    for (const Shot& shot : shots)
+        starts.push_back(shot.place.start);
+    std::ranges::sort(starts);
+    starts.erase(std::unique(starts.begin(), starts.end()), starts.end());
+    return starts;
+}
+
+/// Whether the timecodes exist at the rate, which may be another than that of the lists.
+bool hasTimes(const EventBase& event, const Framerate& framerate)
+{
+    return event.srcIn().isValid(framerate) && event.srcOut().isValid(framerate) && event.dstIn().isValid(framerate) &&
+           event.dstOut().isValid(framerate);
+}
+
 double overlapOf(const Span& a, const Span& b)
 {
     return std::min(a.end, b.end) - std::max(a.start, b.start);
@@ -53,7 +70,7 @@ ChangeMap::ChangeMap(const EventList& change, const EventList& oldCut, const Eve
 {
     for (std::size_t index = 0; index < change.size(); ++index) {
         const EventBase& event = change.at(index);
-        if (!event.isValid())
+        if (!event.isValid() || !hasTimes(event, framerate))
             continue;
         const auto span = [&](const auto& in, const auto& out) {
             return Span{in.toSeconds(framerate) - origin, out.toSeconds(framerate) - origin};
@@ -86,10 +103,8 @@ ChangeMap::ChangeMap(const EventList& change, const EventList& oldCut, const Eve
         }
         std::ranges::sort(m_withoutSound, {}, &Span::start);
     }
-    for (const Shot& shot : shotsOf(m_state == State::Carried ? newCut : oldCut, framerate, origin))
-        m_cuts.push_back(shot.place.start);
-    std::ranges::sort(m_cuts);
-    m_cuts.erase(std::unique(m_cuts.begin(), m_cuts.end()), m_cuts.end());
+    m_oldCuts = startsOf(shotsOf(oldCut, framerate, origin));
+    m_newCuts = startsOf(shotsOf(newCut, framerate, origin));
     m_byPresent = SpanIndex(std::move(present));
     m_byFormer = SpanIndex(std::move(former));
 }

@@ -22,7 +22,7 @@ public:
     enum class State { Planned, Carried };
 
     ChangeMap() = default;
-    /// The events of the change EDL and of both cuts. Events that aren't valid are left out. `origin` is what the clock of the
+    /// The events of the change EDL and of both cuts. Events that aren't valid, or not at this rate, are left out. `origin` is what the clock of the
     /// project shows at its time 0.
     ChangeMap(const cadrel::core::EventList& change, const cadrel::core::EventList& oldCut,
               const cadrel::core::EventList& newCut, const cadrel::core::Framerate& framerate, double origin,
@@ -43,8 +43,11 @@ public:
     std::vector<Span> formerPlaces(const Span& stretch) const;
     /// The new picture, black aside, that no event brings sound for, in order. Empty while nothing was carried over.
     const std::vector<Span>& withoutSound() const { return m_withoutSound; }
-    /// Where the shots of the picture on the tracks begin, in order.
-    const std::vector<double>& cuts() const { return m_cuts; }
+    /// Where the shots of the old (Planned) or of the new cut begin, in order.
+    const std::vector<double>& cuts(State programme) const
+    {
+        return programme == State::Carried ? m_newCuts : m_oldCuts;
+    }
 
 private:
     struct Stretch {
@@ -60,7 +63,8 @@ private:
     SpanIndex m_byPresent;
     SpanIndex m_byFormer;
     std::vector<Span> m_withoutSound;
-    std::vector<double> m_cuts;
+    std::vector<double> m_oldCuts;
+    std::vector<double> m_newCuts;
 };
 
 } // namespace desktop

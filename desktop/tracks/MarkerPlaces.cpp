@@ -13,7 +13,7 @@ std::vector<MarkerPlace> markerPlaces(const SpanIndex& spans, const TimeScale& s
         const Columns columns = LaneBlocks::columnsOf(spans[index], scale, width);
         if (columns.first >= width)
             return;
-        if (!places.empty() && places.back().columns.first == columns.first)
+        if (!places.empty() && places.back().columns == columns)
             places.back() = {index, columns, 0};
         else
             places.push_back({index, columns, 0});

@@ -9,14 +9,14 @@
 
 namespace desktop {
 
-/// A column of a row in which at least one marker begins.
+/// The columns of a marker, one at least, or of several that have the same ones.
 struct MarkerPlace {
-    std::size_t index; ///< of the last marker that begins there
-    Columns columns;   ///< what that one covers, one column at least
-    int room;          ///< columns up to the next place or the edge of the row
+    std::size_t index; ///< of the last of them
+    Columns columns;
+    int room; ///< columns from the first to that of the next place or to the edge of the row; 0 where two begin together
 };
 
-/// The markers of a row of `width` columns, from left to right: however many there are, a column has one place at most.
+/// The markers of a row of `width` columns, from left to right. However many stand in one column, they are one place.
 std::vector<MarkerPlace> markerPlaces(const SpanIndex& spans, const TimeScale& scale, int width);
 
 } // namespace desktop

@@ -22,7 +22,7 @@ public:
 
     /// A frame of a video, at most `height` high; null while it isn't there. It is on its way then, unless there is none.
     virtual juce::Image still(standin::MediaClip& clip, std::uint32_t frame, int height) = 0;
-    /// What was asked for before and not since doesn't have to come any more. To be called before each paint.
+    /// What was asked for until now doesn't have to come any more. To be called before all that is seen is drawn anew.
     virtual void startAsking() = 0;
     /// Takes what has come. True when `still` gives more than before. To be called over and over.
     virtual bool poll() = 0;

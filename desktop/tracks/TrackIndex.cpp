@@ -3,6 +3,7 @@
 #include "desktop/tracks/TrackIndex.h"
 
 #include "core/cut/MarkerTrack.h"
+#include "host/track/TrackRole.h"
 #include "standin/project/Envelope.h"
 #include "standin/project/Marker.h"
 #include "standin/project/Part.h"
@@ -16,6 +17,7 @@ namespace desktop {
 
 using cadrel::core::MarkerKind;
 using cadrel::core::MarkerTrack;
+using cadrel::host::TrackRole;
 using standin::Container;
 using standin::Event;
 using standin::Node;
@@ -49,14 +51,27 @@ CurvePoints pointsOf(const standin::Envelope& curve)
     return points;
 }
 
-MarkerLook lookOf(const Track& track)
+/// What a run uses the track for, a TrackRole, as an attribute says; nothing for other tracks.
+std::optional<std::int32_t> roleOf(const Track& track, const char* attribute)
 {
-    const auto found = track.attributes().find(Velmark::AttributeKey::MarkerType);
+    const auto found = track.attributes().find(attribute);
     const auto* const role =
         found != track.attributes().end() ? std::get_if<Velmark::int64>(&found->second.value) : nullptr;
+    return role ? std::optional(static_cast<std::int32_t>(*role)) : std::nullopt;
+}
+
+bool isNewPicture(const Track& track)
+{
+    const std::optional<std::int32_t> role = roleOf(track, Velmark::AttributeKey::VideoType);
+    return role && (*role & ~TrackRole::OwnVideo) == TrackRole::NewVideo;
+}
+
+MarkerLook lookOf(const Track& track)
+{
+    const std::optional<std::int32_t> role = roleOf(track, Velmark::AttributeKey::MarkerType);
     if (!role)
         return MarkerLook::User;
-    const MarkerTrack* const markers = MarkerTrack::ofRole(static_cast<std::int32_t>(*role));
+    const MarkerTrack* const markers = MarkerTrack::ofRole(*role);
     if (!markers)
         return MarkerLook::User;
     switch (markers->kind) {
@@ -107,6 +122,7 @@ TrackIndex::TrackIndex(const standin::Project& project)
         if (!track->isFolder()) {
             row.lane = Lane(*track, 0.0);
             row.markers = lookOf(*track);
+            row.isNewPicture = isNewPicture(*track);
         }
         for (const auto& [number, curve] : track->curves()) {
             if (curve->firstPoint())

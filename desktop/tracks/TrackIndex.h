@@ -76,6 +76,7 @@ struct TrackRow {
     Lane lane;
     std::vector<CurvePoints> curves; ///< those with points
     MarkerLook markers = MarkerLook::User;
+    bool isNewPicture = false; ///< of the cut to which the tracks are carried over
 };
 
 /// All of a project that is drawn, sorted, as it was when this was made.

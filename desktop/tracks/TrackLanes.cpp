@@ -107,11 +107,12 @@ void TrackLanes::paint(juce::Graphics& graphics)
 {
     cadrel::gui::guardSystem([&] {
         graphics.fillAll(toColour(TracksPalette::ground));
-        if (Stills* const stills = m_view.stills())
+        const juce::Rectangle<int> clip = graphics.getClipBounds();
+        // A part that is drawn anew says nothing of the stills beside it.
+        if (Stills* const stills = m_view.stills(); stills && clip == getLocalBounds())
             stills->startAsking();
         const RowLayout& rows = m_view.rows();
         const int offset = m_view.rowOffset();
-        const juce::Rectangle<int> clip = graphics.getClipBounds();
         for (std::size_t row = rows.firstBelow(clip.getY() + offset);
              row < rows.count() && rows.top(row) - offset < clip.getBottom(); ++row)
             paintRow(graphics, row, {0, rows.top(row) - offset, getWidth(), rows.heightOf(row)});
@@ -134,7 +135,7 @@ void TrackLanes::paintRow(juce::Graphics& graphics, std::size_t row, juce::Recta
         paintMarkers(graphics, shown, area);
         return;
     }
-    if (kind == Track::Kind::Audio)
+    if (kind == Track::Kind::Audio && m_view.stateOf(shown) == ChangeMap::State::Carried)
         paintWithoutSound(graphics, area);
     const Columns all{0, getWidth()};
     paintLane(graphics, shown, shown.lane, all, area);
@@ -171,15 +172,23 @@ void TrackLanes::paintMarkers(juce::Graphics& graphics, const TrackRow& row, juc
         }
         graphics.setColour(colour);
         graphics.fillRect(columns.first, area.getY() + 2, 1, area.getHeight() - 4);
-        if (room <= MarkerSymbol::Size + 2)
+        const int end = columns.first + room;
+        int left = columns.first + 2;
+        if (left >= 0) {
+            if (end - left < MarkerSymbol::Size)
+                continue;
+            MarkerSymbol::draw(graphics, row.markers, static_cast<float>(left), static_cast<float>(symbolTop));
+            left += MarkerSymbol::Size;
+        } else if (!isRange) {
             continue;
-        MarkerSymbol::draw(graphics, row.markers, static_cast<float>(columns.first + 2), static_cast<float>(symbolTop));
-        const int left = columns.first + MarkerSymbol::Size + 6;
-        const int nameRoom = columns.first + room - NamePad - left;
+        }
+        left = std::max(left, 0) + NamePad;
+        // The name of a range stays in sight for as long as the range does.
+        const int nameEnd = (columns.first < 0 ? std::min(end, columns.end) : end) - NamePad;
         graphics.setColour(toColour(Palette::text));
-        if (nameRoom >= LeastNameWidth)
+        if (nameEnd - left >= LeastNameWidth)
             m_names.draw(graphics, row.lane.item(index).event->name(), static_cast<float>(left),
-                         static_cast<float>(baseline), static_cast<float>(nameRoom));
+                         static_cast<float>(baseline), static_cast<float>(nameEnd - left));
     }
 }
 
@@ -187,8 +196,16 @@ void TrackLanes::paintLane(juce::Graphics& graphics, const TrackRow& row, const 
                            juce::Rectangle<int> area)
 {
     const LaneBlocks drawn(lane.spans(), m_view.scale(), shown, getWidth());
-    for (const LaneBlocks::Block& block : drawn.blocks)
+    int end = -LaneBlocks::Beyond;
+    for (const LaneBlocks::Block& block : drawn.blocks) {
+        // A block that lies on another one has an edge.
+        if (block.columns.first < end) {
+            graphics.setColour(toColour(TracksPalette::line));
+            graphics.fillRect(block.columns.first - 1, area.getY(), block.columns.count() + 1, area.getHeight());
+        }
+        end = std::max(end, block.columns.end);
         paintBlock(graphics, row, lane, block, area);
+    }
     const bool isPicture = row.track->kind() == Track::Kind::Video;
     graphics.setColour(toColour(row.track->isLocked() ? TracksPalette::lockedName
                                 : isPicture           ? TracksPalette::pictureName
@@ -202,7 +219,7 @@ void TrackLanes::paintBlock(juce::Graphics& graphics, const TrackRow& row, const
 {
     const Lane::Item& item = lane.item(block.index);
     const SpanIndex::Span& span = lane.spans()[block.index];
-    const bool isMarked = m_view.isShown(span);
+    const bool isMarked = m_view.isShown(row, span);
     const BlockColours colours = coloursOf(*row.track, item.kind, isMarked);
     // Without a gap, a cut between two blocks could hardly be seen.
     area.setHorizontalRange({block.columns.first, block.columns.end - 1});
@@ -224,7 +241,7 @@ void TrackLanes::paintBlock(juce::Graphics& graphics, const TrackRow& row, const
             }
         } else if (row.track->kind() == Track::Kind::Video) {
             if (auto* const clip = dynamic_cast<standin::ClipEvent*>(item.event.get()))
-                paintStills(graphics, *clip, span, area);
+                paintStills(graphics, row, *clip, span, area);
         }
     }
     if (item.kind == Lane::Kind::Part && whole.getWidth() > 4) {
@@ -252,14 +269,14 @@ void TrackLanes::paintBlock(juce::Graphics& graphics, const TrackRow& row, const
                      static_cast<float>(right - left));
 }
 
-void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event, const SpanIndex::Span& span,
-                             juce::Rectangle<int> area)
+void TrackLanes::paintStills(juce::Graphics& graphics, const TrackRow& row, standin::ClipEvent& event,
+                             const SpanIndex::Span& span, juce::Rectangle<int> area)
 {
     Stills* const stills = m_view.stills();
     standin::MediaClip* const clip = event.clip();
     if (!stills || !clip || clip->kind() != standin::MediaClip::Kind::Video)
         return;
-    const auto starts = m_view.shotsIn(span, StillSpacing);
+    const auto starts = m_view.shotsIn(row, span, StillSpacing);
     const float pixelScale = graphics.getInternalContext().getPhysicalPixelScaleFactor();
     const double rate = m_view.clock().framerate().rate;
     for (std::size_t shot = 0; shot < starts.size(); ++shot) {
@@ -268,6 +285,9 @@ void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event
         const int right = LaneBlocks::columnsOf({end, end}, m_view.scale(), getWidth()).first - 1;
         if (right - left < LeastStill || right <= 0 || left >= getWidth())
             continue;
+        const juce::Graphics::ScopedSaveState state(graphics);
+        if (!graphics.reduceClipRegion(left, area.getY(), right - left, area.getHeight()))
+            continue;
         const double place = event.sourceOffset() + std::max(starts[shot] - span.start, 0.0);
         const auto frame = static_cast<std::uint32_t>(std::max(std::floor((place + standin::SameInstant) * rate), 0.0));
         const int height = static_cast<int>(std::ceil(static_cast<float>(area.getHeight()) * pixelScale));
@@ -275,8 +295,7 @@ void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event
         if (!still.isValid())
             continue;
         const int width = still.getWidth() * area.getHeight() / std::max(still.getHeight(), 1);
-        const juce::Graphics::ScopedSaveState state(graphics);
-        graphics.reduceClipRegion(left, area.getY(), right - left, area.getHeight());
+        graphics.setOpacity(1.0F);
         graphics.drawImage(still, left, area.getY(), width, area.getHeight(), 0, 0, still.getWidth(),
                            still.getHeight());
     }
@@ -284,10 +303,14 @@ void TrackLanes::paintStills(juce::Graphics& graphics, standin::ClipEvent& event
 
 void TrackLanes::paintCurve(juce::Graphics& graphics, const CurvePoints& curve, juce::Rectangle<int> area)
 {
+    // Names stay readable above it; those of low rows, which have no room for both, through it.
+    const bool isLow = area.getHeight() < NameHeight + LeastBody;
+    if (!isLow)
+        area.removeFromTop(NameHeight);
     const float top = static_cast<float>(area.getY() + CurveEdge);
     const float room = static_cast<float>(area.getHeight() - 2 * CurveEdge - 1);
     const auto y = [&](float value) { return top + (1.0F - value) * room; };
-    graphics.setColour(colourOf(curve.number).withAlpha(0.85F));
+    graphics.setColour(colourOf(curve.number).withAlpha(isLow ? 0.4F : 0.85F));
 
     const TimeScale& scale = m_view.scale();
     const auto begin = curve.times.begin();
@@ -314,7 +337,7 @@ void TrackLanes::paintGhosts(juce::Graphics& graphics, std::size_t row, juce::Re
 {
     const LaneBlocks drawn(m_view.ghostsOf(row), m_view.scale(), getWidth());
     const Columns seen{0, getWidth()};
-    const juce::Colour line = toColour(Palette::light).withAlpha(0.75F);
+    const juce::Colour line = toColour(Palette::light).withAlpha(0.6F);
     const juce::Colour fill = toColour(Palette::light).withAlpha(0.07F);
     const auto paintGhost = [&](const Columns& columns) {
         graphics.setColour(fill);

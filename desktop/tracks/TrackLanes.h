@@ -29,8 +29,6 @@ public:
     void mouseDown(const juce::MouseEvent& event) override;
 
 private:
-    struct Look;
-
     void paintRow(juce::Graphics& graphics, std::size_t row, juce::Rectangle<int> area);
     void paintWithoutSound(juce::Graphics& graphics, juce::Rectangle<int> area);
     void paintMarkers(juce::Graphics& graphics, const TrackRow& row, juce::Rectangle<int> area);
@@ -39,8 +37,8 @@ private:
                    juce::Rectangle<int> area);
     void paintBlock(juce::Graphics& graphics, const TrackRow& row, const Lane& lane, const LaneBlocks::Block& block,
                     juce::Rectangle<int> area);
-    void paintStills(juce::Graphics& graphics, standin::ClipEvent& event, const SpanIndex::Span& span,
-                     juce::Rectangle<int> area);
+    void paintStills(juce::Graphics& graphics, const TrackRow& row, standin::ClipEvent& event,
+                     const SpanIndex::Span& span, juce::Rectangle<int> area);
     void paintCurve(juce::Graphics& graphics, const CurvePoints& curve, juce::Rectangle<int> area);
     void paintGhosts(juce::Graphics& graphics, std::size_t row, juce::Rectangle<int> area);
     void paintLines(juce::Graphics& graphics);

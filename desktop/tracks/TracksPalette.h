@@ -18,7 +18,7 @@ struct TracksPalette {
     static constexpr Colour dimText = cadrel::gui::opaque(139, 149, 158);   ///< small labels, folders
     static constexpr Colour soundBody = cadrel::gui::opaque(44, 69, 93);    ///< a clip of sound below its name
     static constexpr Colour soundStrip =
-        cadrel::gui::opaque(53, 85, 115); ///< many clips that are too short to be told apart
+        cadrel::gui::opaque(76, 120, 161); ///< many clips that are too short to be told apart
     static constexpr Colour pictureName = cadrel::gui::opaque(74, 86, 104); ///< the name of a clip of picture
     static constexpr Colour pictureBody = cadrel::gui::opaque(38, 45, 55);  ///< below it, where there is no still
     static constexpr Colour partName = cadrel::gui::opaque(96, 103, 124);   ///< the name of a part

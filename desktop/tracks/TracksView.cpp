@@ -10,6 +10,7 @@
 #include "desktop/tracks/TracksPalette.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/Text.h"
+#include "standin/base/Times.h"
 #include "standin/edit/EditService.h"
 #include "standin/project/Project.h"
 
@@ -130,17 +131,35 @@ const SpanIndex& TracksView::ghostsOf(std::size_t row)
 {
     update();
     std::unique_ptr<SpanIndex>& ghosts = m_ghosts[row];
-    if (!ghosts) {
-        std::vector<SpanIndex::Span> places;
-        const SpanIndex& spans = m_index.rows()[row].lane.spans();
-        for (std::size_t index = 0; index < spans.size(); ++index) {
-            for (const SpanIndex::Span& place : m_change.formerPlaces(spans[index]))
-                places.push_back(place);
-        }
-        std::ranges::stable_sort(places, {}, &SpanIndex::Span::start);
-        ghosts = std::make_unique<SpanIndex>(std::move(places));
-    }
+    if (!ghosts)
+        ghosts = std::make_unique<SpanIndex>(findGhosts(m_index.rows()[row]));
     return *ghosts;
+}
+
+SpanIndex TracksView::findGhosts(const TrackRow& row) const
+{
+    struct Ghost {
+        SpanIndex::Span place;
+        const std::u16string* name;
+    };
+    std::vector<Ghost> ghosts;
+    const Lane& lane = row.lane;
+    for (std::size_t index = 0; index < lane.size() && stateOf(row) == ChangeMap::State::Carried; ++index) {
+        for (const SpanIndex::Span& place : m_change.formerPlaces(lane.spans()[index]))
+            ghosts.push_back({place, &lane.item(index).event->name()});
+    }
+    std::ranges::stable_sort(ghosts, {}, [](const Ghost& ghost) { return ghost.place.start; });
+    std::vector<SpanIndex::Span> places;
+    const std::u16string* lastName = nullptr;
+    for (const auto& [place, name] : ghosts) {
+        // Pieces of what was one clip.
+        if (lastName && *lastName == *name && std::abs(places.back().end - place.start) < standin::SameInstant)
+            places.back().end = place.end;
+        else
+            places.push_back(place);
+        lastName = name;
+    }
+    return SpanIndex(std::move(places));
 }
 
 int TracksView::viewWidth() const
@@ -231,9 +250,8 @@ void TracksView::showEvent(std::optional<std::size_t> event)
     m_shownEvent = event;
     if (const auto place = event ? m_change.placeOf(*event) : std::nullopt) {
         const double first = m_scale.pixelAt(place->start);
-        const double end = m_scale.pixelAt(place->end);
-        // It stays where it is if it can be seen, and else comes to where there is something before it.
-        if (first < 0.0 || end > viewWidth())
+        // What is seen stays as it is if the event begins in it. Else it shows something before the event, too.
+        if (first < 0.0 || first > 0.9 * viewWidth())
             scrollTo(place->start - 0.2 * viewWidth() * m_scale.secondsPerPixel());
     }
     m_lanes->repaint();
@@ -249,11 +267,16 @@ void TracksView::locate(double seconds)
         onLocate(place);
 }
 
-std::optional<std::size_t> TracksView::eventOf(SpanIndex::Span clip)
+ChangeMap::State TracksView::stateOf(const TrackRow& row) const
+{
+    return row.track->isLocked() ? ChangeMap::State::Planned : m_change.state();
+}
+
+std::optional<std::size_t> TracksView::eventOf(const TrackRow& row, SpanIndex::Span clip)
 {
     if (m_change.isEmpty())
         return std::nullopt;
-    ChangeMap::State programme = m_change.state();
+    ChangeMap::State programme = stateOf(row);
     const double offset = previewOffset();
     if (clip.start >= offset - m_clock.origin()) {
         clip = {clip.start - offset, clip.end - offset};
@@ -262,26 +285,29 @@ std::optional<std::size_t> TracksView::eventOf(SpanIndex::Span clip)
     return m_change.eventOf(clip, programme);
 }
 
-bool TracksView::isShown(const SpanIndex::Span& clip)
+bool TracksView::isShown(const TrackRow& row, const SpanIndex::Span& clip)
 {
-    return m_shownEvent && eventOf(clip) == m_shownEvent;
+    return m_shownEvent && eventOf(row, clip) == m_shownEvent;
 }
 
-std::vector<double> TracksView::shotsIn(const SpanIndex::Span& clip, int spacing)
+std::vector<double> TracksView::shotsIn(const TrackRow& row, const SpanIndex::Span& clip, int spacing)
 {
     const double first = std::max(clip.start, m_scale.left());
     const double last = std::min(clip.end, m_scale.secondsAt(viewWidth()));
+    const double previewStart = previewOffset() - m_clock.origin();
+    const double offset = clip.start >= previewStart ? previewOffset() : 0.0;
+    const bool showsNewCut = row.isNewPicture || offset > 0.0;
     std::vector<double> starts;
-    const std::vector<double>& cuts = m_change.cuts();
+    const std::vector<double>& cuts = m_change.cuts(showsNewCut ? ChangeMap::State::Carried : stateOf(row));
     if (!cuts.empty()) {
         // The shot that runs at the left edge begins before it.
-        auto cut = std::upper_bound(cuts.begin(), cuts.end(), first);
-        starts.push_back(cut == cuts.begin() ? clip.start : std::max(*std::prev(cut), clip.start));
-        for (; cut != cuts.end() && *cut < last; ++cut)
-            starts.push_back(*cut);
+        auto cut = std::upper_bound(cuts.begin(), cuts.end(), first - offset);
+        starts.push_back(cut == cuts.begin() ? clip.start : std::max(*std::prev(cut) + offset, clip.start));
+        for (; cut != cuts.end() && *cut + offset < last; ++cut)
+            starts.push_back(*cut + offset);
         // Ends the last one that is seen.
-        if (cut != cuts.end() && *cut < clip.end)
-            starts.push_back(*cut);
+        if (cut != cuts.end() && *cut + offset < clip.end)
+            starts.push_back(*cut + offset);
         return starts;
     }
     // At places that don't move when the view is scrolled.
@@ -296,13 +322,14 @@ std::vector<double> TracksView::shotsIn(const SpanIndex::Span& clip, int spacing
 
 void TracksView::clicked(std::size_t row, int column)
 {
-    const Lane& lane = index().rows()[row].lane;
-    const std::optional<std::size_t> hit = LaneBlocks::hit(lane.spans(), m_scale, column, viewWidth());
-    if (!hit || m_index.rows()[row].track->kind() == Track::Kind::Marker) {
+    const TrackRow& shown = index().rows()[row];
+    const SpanIndex& spans = shown.lane.spans();
+    const std::optional<std::size_t> hit = LaneBlocks::hit(spans, m_scale, column, viewWidth());
+    if (!hit || !shown.track->hasAutomation()) {
         locate(m_scale.secondsAt(column));
         return;
     }
-    if (const std::optional<std::size_t> event = eventOf(lane.spans()[*hit])) {
+    if (const std::optional<std::size_t> event = eventOf(shown, spans[*hit])) {
         m_shownEvent = event;
         m_lanes->repaint();
         if (onClipClicked)
@@ -318,6 +345,7 @@ void TracksView::toggleLock(std::size_t row)
     const bool isLocked = !track.isLocked();
     track.setLocked(isLocked);
     m_edits.commit(&m_project, isLocked ? u"Lock Track" : u"Unlock Track");
+    m_ghosts[row].reset();
     repaint();
     if (onTrackChanged)
         onTrackChanged();

@@ -66,7 +66,8 @@ public:
 
     // The change.
 
-    /// What was recut, and whether the tracks fit it already. An empty map forgets it.
+    /// What was recut, and whether the tracks fit it already: all but the locked ones, which no run touches. An empty map
+    /// forgets it.
     void setChange(ChangeMap change);
     /// Whether outlines show where each clip stood before.
     void setGhosts(bool shown);
@@ -102,10 +103,12 @@ public:
     /// How much later the preview stretch is, in seconds.
     double previewOffset();
     /// Whether the event that showEvent was given has moved a clip, or moves it.
-    bool isShown(const SpanIndex::Span& clip);
+    bool isShown(const TrackRow& row, const SpanIndex::Span& clip);
     /// Where the shots begin that a clip of picture has in sight: at the clip's start and at the cuts that are known. While none
     /// are known, every so many pixels.
-    std::vector<double> shotsIn(const SpanIndex::Span& clip, int spacing);
+    std::vector<double> shotsIn(const TrackRow& row, const SpanIndex::Span& clip, int spacing);
+    /// Which programme a track fits.
+    ChangeMap::State stateOf(const TrackRow& row) const;
     /// Where each clip of a row stood.
     const SpanIndex& ghostsOf(std::size_t row);
     void locate(double seconds);
@@ -119,7 +122,8 @@ private:
 
     void update();
     /// The event that moves a clip, or has moved it there.
-    std::optional<std::size_t> eventOf(SpanIndex::Span clip);
+    std::optional<std::size_t> eventOf(const TrackRow& row, SpanIndex::Span clip);
+    SpanIndex findGhosts(const TrackRow& row) const;
     void viewChanged();
     void moveRows(int offset);
     void changeRowSize(int steps);

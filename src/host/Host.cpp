@@ -225,6 +225,9 @@ void Host::settleAfterUndo(Project& project)
 {
     FirstFailure failure;
     const bool isActive = project.model().isPreviewActive();
+    // What is undone next goes back to the preview that has come back.
+    if (isActive && project.hasWritten())
+        m_restorePreviewState = false;
     project.findLockedTracks();
     // A preview that has come back needs its room, and one that has gone doesn't.
     if (!isActive || project.hasPreviewOffset())

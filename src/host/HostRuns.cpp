@@ -39,6 +39,13 @@ constexpr const wchar_t* LeftOutOfOne =
 constexpr const wchar_t* LeftOutOfMany =
     L"Left out, as it would stand before the project or its day begins: material of %s events, first of event %s.";
 
+/// A damaged project may have some between which nothing lies.
+void requireSoundBounds(const core::Settings& settings)
+{
+    if (settings.restrictRange() && !(settings.preserveMaterialBefore() <= settings.preserveMaterialAfter()))
+        throw Result::CorruptData;
+}
+
 bool isOnlySelected(const core::Settings& settings)
 {
     return settings.applyTo() == core::ApplyTo::SelectedTracks;
@@ -124,6 +131,7 @@ Result::Type Host::requestRun(const std::optional<core::SecondsRange>& bounds)
     return resultOf([&] {
         requireIdle();
         prepareStart();
+        requireSoundBounds(m_currentProject->model().settings());
         m_runRequested = true;
         m_runBounds = bounds;
     });
@@ -356,13 +364,14 @@ Result::Type Host::withProgress(Project& project, const Appearance& appearance, 
                        estimateSteps(eventCount, project.model().settings(), 0), appearance.canCancel);
         work();
     });
+    // The user may edit while the window closes.
+    project.setUseTrackCache(false);
     // Not there when it couldn't be started.
     resultOf([&] { progress.finish(); });
     if (isBlocked)
         idleManager->setIdleBlocked(false);
     m_progress = nullptr;
     project.setProgress(nullptr);
-    project.setUseTrackCache(false);
     return result;
 }
 

@@ -129,7 +129,7 @@ struct AttributeKey {
     static constexpr const char* Preview = "Cadrel:Preview";
     /// On such a track, beside it: an IAttributeData with numbers of each event.
     static constexpr const char* PreviewEvents = "Cadrel:PreviewEvents";
-    /// On such a track: an IAttributeData with the numbers of the automation curves on which something was written.
+    /// On such a track, beside these: an IAttributeData with numbers of each automation point.
     static constexpr const char* PreviewCurves = "Cadrel:PreviewCurves";
     /// On the project while a preview has room past its end: an IAttributeData with numbers.
     static constexpr const char* ProjectEnd = "Cadrel:ProjectEnd";

@@ -26,6 +26,9 @@ fs::path besideWith(const fs::path& file, const char* extension)
 
 bool ArdourForm::recognises(std::string_view text)
 {
+    // A text of 16 bits a character, which the reader refuses by its name.
+    if (text.starts_with("\xFF\xFE") || text.starts_with("\xFE\xFF"))
+        return true;
     if (text.starts_with("\xEF\xBB\xBF"))
         text.remove_prefix(3);
     const std::size_t first = text.find_first_not_of(" \t\r\n");
@@ -34,12 +37,18 @@ bool ArdourForm::recognises(std::string_view text)
 
 Velmark::Counted<Project> ArdourForm::read(std::string text, const fs::path& file, ChangeLog& log)
 {
-    ArdourReader reader(std::move(text), file);
-    Velmark::Counted<Project> project = reader.read(log);
-    ArdourSession session = reader.takeSession();
-    session.ownAsRead = OwnStorage::textOf(*project);
-    project->setForm(std::make_unique<ArdourForm>(std::move(session), file.parent_path()));
-    return project;
+    try {
+        ArdourReader reader(std::move(text), file);
+        Velmark::Counted<Project> project = reader.read(log);
+        ArdourSession session = reader.takeSession();
+        session.ownAsRead = OwnStorage::textOf(*project);
+        project->setForm(std::make_unique<ArdourForm>(std::move(session), file.parent_path()));
+        return project;
+    } catch (const FileFault& fault) {
+        if (!fault.remedy().empty())
+            throw;
+        throw fault.withRemedy("open the session in Ardour and save it there, or take an intact copy");
+    }
 }
 
 std::string ArdourForm::textOf(const Project& project) const
@@ -53,8 +62,8 @@ void ArdourForm::requireFree(const fs::path& file) const
     const fs::path pending = besideWith(file, ".pending");
     if (fs::exists(pending, ignored)) {
         throw FileFault("Ardour has unsaved work in " + quoted(std::string_view(pending.filename().native())) +
-                        ", which it would open in place of this session: open the session in Ardour and save it, or "
-                        "remove that file");
+                        ", which it would open in place of this session")
+            .withRemedy("open the session in Ardour and save it, or remove that file");
     }
 }
 
@@ -66,10 +75,13 @@ void ArdourForm::requirePlace(const fs::path& file) const
         fs::weakly_canonical(file.parent_path().empty() ? fs::path(".") : file.parent_path(), error);
     if (error || folder != target) {
         throw FileFault("lies outside of the session's folder " + quoted(std::string_view(folder.native())) +
-                        ", and Ardour looks for the sound beside the session");
+                        ", and Ardour looks for the sound beside the session")
+            .withRemedy("name a file in that folder");
     }
-    if (file.extension() != Extension)
-        throw FileFault("has another ending than " + std::string(Extension) + ", which Ardour asks for");
+    if (file.extension() != Extension) {
+        throw FileFault("has another ending than " + std::string(Extension) + ", which Ardour asks for")
+            .withRemedy("end the name in " + std::string(Extension));
+    }
 }
 
 void ArdourForm::wasWritten(const fs::path& file) const

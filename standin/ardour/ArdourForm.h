@@ -34,6 +34,7 @@ public:
     void requireFree(const std::filesystem::path& file) const override;
     void requirePlace(const std::filesystem::path& file) const override;
     void wasWritten(const std::filesystem::path& file) const override;
+    bool hasBrokenStorage() const override { return m_session.isOwnBroken; }
     std::vector<std::string> staying() const override { return m_session.staying; }
     void setEdgeFade(double seconds) override { m_session.edgeFade = m_session.clock.samplesOf(seconds); }
 

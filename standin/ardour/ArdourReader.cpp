@@ -4,7 +4,9 @@
 
 #include "standin/ardour/ListText.h"
 #include "standin/ardour/OwnStorage.h"
+#include "standin/ardour/RegionFades.h"
 #include "standin/base/Text.h"
+#include "standin/base/Times.h"
 #include "standin/base/Utf16.h"
 #include "standin/project/AutomationPoint.h"
 #include "standin/project/ClipEvent.h"
@@ -13,6 +15,7 @@
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
 #include "standin/stage/ProjectReader.h"
+#include "velmark/Attributes.h"
 
 #include <algorithm>
 #include <array>
@@ -22,6 +25,7 @@
 #include <optional>
 #include <system_error>
 
+using Velmark::AttributeKey;
 using Velmark::Counted;
 using Velmark::FrameRateInfo;
 using Velmark::makeCounted;
@@ -35,6 +39,9 @@ namespace {
 constexpr unsigned int ParseAll = pugi::parse_cdata | pugi::parse_escapes | pugi::parse_eol | pugi::parse_doctype;
 /// No session nests its elements deeper than a handful of levels.
 constexpr int DeepestElement = 200;
+
+/// The number by which Cadrel knows the track of the old picture.
+constexpr Velmark::int64 OldVideo = 10;
 
 /// The first of the curves that have no fixed number.
 constexpr int FirstFreeCurve = 101;
@@ -106,12 +113,10 @@ void setId(Node& node, const char* key, SessionId id)
 std::u16string markerName(std::string_view location, const Track& track)
 {
     const std::u16string name = textOf(location);
-    const std::u16string prefix = ownLocationName(track.name(), u"");
-    if (name == prefix)
+    if (name == track.name())
         return std::u16string();
-    const std::u16string longer = ownLocationName(track.name(), u" ");
-    const std::size_t size = longer.size() - 1;
-    return name.starts_with(longer.substr(0, size)) ? name.substr(size) : name;
+    const std::u16string kind = track.name() + u": ";
+    return name.starts_with(kind) ? name.substr(kind.size()) : name;
 }
 
 bool hasPoints(const Track& track)
@@ -145,6 +150,7 @@ public:
 ArdourReader::ArdourReader(std::string text, const std::filesystem::path& file) : m_file(file)
 {
     m_session.text = std::move(text);
+    requireUtf8();
     const pugi::xml_parse_result result =
         m_document.load_buffer(m_session.text.data(), m_session.text.size(), ParseAll, pugi::encoding_utf8);
     if (!result) {
@@ -152,25 +158,50 @@ ArdourReader::ArdourReader(std::string text, const std::filesystem::path& file) 
         const auto line = std::count(m_session.text.begin(), m_session.text.begin() + offset, '\n') + 1;
         throw FileFault("line " + std::to_string(line), "isn't XML: " + std::string(result.description()));
     }
+    m_root = m_document.document_element();
     for (const pugi::xml_node& node : m_document.children()) {
         if (node.type() == pugi::node_doctype)
             throw FileFault("the file declares a document type, which no session does");
+        if (node.type() == pugi::node_element && node != m_root)
+            throw FileFault("the file goes on after the end of the session");
     }
-    m_root = m_document.document_element();
     if (std::strcmp(m_root.name(), "Session") != 0)
         throw FileFault("is XML, but no session of Ardour");
     const int version = m_root.attribute("version").as_int();
     if (version > NewestVersion) {
-        throw FileFault("version", "is " + std::to_string(version) +
-                                       ": written by a newer Ardour than 7, which can't be "
-                                       "read yet");
+        throw FileFault("version",
+                        "is " + std::to_string(version) + ": written by a newer Ardour than 7, which can't be read yet")
+            .withRemedy("take a copy that Ardour 7 has saved");
     }
     if (version < OldestVersion) {
-        throw FileFault("version", "is " + quoted(m_root.attribute("version").value()) +
-                                       ": older than Ardour 6; open the session in Ardour 7 and save it there");
+        throw FileFault("version", "is " + quoted(m_root.attribute("version").value()) + ": older than Ardour 6")
+            .withRemedy("open the session in Ardour 7 and save it there");
     }
     m_session.clock = SessionClock(m_root);
     m_session.element = rangeOf(m_root);
+}
+
+void ArdourReader::requireUtf8() const
+{
+    const std::string_view text = m_session.text;
+    const auto refuse = [](std::string_view encoding) {
+        throw FileFault("the file is " + quoted(encoding) + ", but Ardour writes UTF-8")
+            .withRemedy("convert it to UTF-8, or take the file that Ardour has saved");
+    };
+    if (text.starts_with("\xFF\xFE") || text.starts_with("\xFE\xFF"))
+        refuse("UTF-16");
+    pugi::xml_document declared;
+    const std::size_t begin = text.find("<?xml");
+    const std::size_t end = text.find("?>", begin);
+    if (begin == text.npos || end == text.npos || text.find('<') != begin ||
+        !declared.load_buffer(&text[begin], end + 2 - begin, pugi::parse_declaration | pugi::parse_fragment,
+                              pugi::encoding_utf8))
+        return;
+    std::string encoding = declared.first_child().attribute("encoding").as_string("UTF-8");
+    std::ranges::transform(encoding, encoding.begin(),
+                           [](char c) { return c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c; });
+    if (encoding != "UTF-8" && encoding != "UTF8" && encoding != "US-ASCII")
+        refuse(encoding);
 }
 
 TextRange ArdourReader::rangeOf(const pugi::xml_node& node) const
@@ -187,18 +218,30 @@ Counted<Project> ArdourReader::read(ChangeLog& log)
 {
     findIds();
     findExtra();
-    const Counted<Project> project =
-        m_session.ownText.empty() ? makeCounted<Project>(log) : ProjectReader::read(m_session.ownText, log);
+    const Counted<Project> project = m_session.ownText.empty() ? makeCounted<Project>(log) : readOwn(log);
     m_project = project.get();
     readClock(*project);
     readSources(*project);
     readRoutes(*project);
     dropGoneTracks(*project);
     readLocations(*project);
+    readVideo(*project);
     m_session.contentEnd = contentEnd(*project);
     project->showChanges();
     project->clearChanges();
     return project;
+}
+
+Counted<Project> ArdourReader::readOwn(ChangeLog& log)
+{
+    try {
+        return ProjectReader::read(m_session.ownText, log);
+    } catch (const FileFault&) {
+        // The sound of the user is whole.
+        m_session.isOwnBroken = true;
+        m_session.ownMarkers.clear();
+        return makeCounted<Project>(log);
+    }
 }
 
 void ArdourReader::findIds()
@@ -251,6 +294,12 @@ void ArdourReader::readClock(Project& project)
     project.setTimeOrigin(optionOf("timecode-offset-negative") == "0" ? -seconds : seconds);
 }
 
+std::filesystem::path ArdourReader::folderOfSession() const
+{
+    std::error_code ignored;
+    return std::filesystem::absolute(m_file, ignored).parent_path();
+}
+
 void ArdourReader::readSources(Project& project)
 {
     // How much of a source the regions know.
@@ -274,8 +323,7 @@ void ArdourReader::readSources(Project& project)
     }
 
     // Ardour names the folder of a session's sound after the session's own.
-    std::error_code ignored;
-    const std::filesystem::path session = std::filesystem::absolute(m_file, ignored).parent_path();
+    const std::filesystem::path session = folderOfSession();
     const std::filesystem::path folder = session / "interchange" / session.filename() / "audiofiles";
     for (const pugi::xml_node& source : m_root.child("Sources").children("Source")) {
         if (std::strcmp(source.attribute("type").value(), "audio") != 0)
@@ -390,17 +438,22 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
         if (at == length.npos)
             throw FileFault(quoted(std::string_view(name)), "has the length " + quoted(length) + ", which is none");
         read.position = clock.samples(length.substr(at + 1));
-        read.length = clock.endInSamples(length.substr(at + 1), length.substr(0, at)) - read.position;
+        read.length = clock.lengthInSamples(length.substr(at + 1), length.substr(0, at));
     } else {
         read.position = clock.samples(region.attribute("position").value());
         read.length = clock.samples(length);
     }
     read.start = clock.samples(region.attribute("start").value());
+    const SessionId source = idIn(region.attribute("source-0").value()).value_or(-1);
+    read.source = source;
+    if (region.child("Extra")) {
+        read.head = CutMark::read(region, "head", read.start, RegionFades::lengthIn(region, clock));
+        read.tail = CutMark::read(region, "tail", read.start + read.length, RegionFades::lengthOut(region, clock));
+    }
     if (!m_session.regions.emplace(id, read).second)
         throw FileFault(quoted(std::string_view(name)),
                         "has the id " + std::to_string(id) + ", which is another region's");
 
-    const SessionId source = idIn(region.attribute("source-0").value()).value_or(-1);
     // What a combined region plays stands in the region itself.
     const pugi::xml_node nested = region.child("NestedSource").child("Source");
     if (nested && !m_clips.contains(source) && idIn(nested.attribute("id").value()) == source) {
@@ -442,7 +495,8 @@ void ArdourReader::readLists(SessionId route, const pugi::xml_node& node, Track&
             const std::string_view what = child.attribute("automation-id").value();
             const std::string_view type = parent.parent().attribute("type").value();
             int number = 0;
-            if (what == "gain" && type == "amp")
+            const bool isVca = route < 0;
+            if (what == "gain" && (type == "amp" || isVca))
                 number = Envelope::Curve::Volume;
             else if (what == "pan-azimuth")
                 number = Envelope::Curve::Pan;
@@ -544,6 +598,45 @@ void ArdourReader::readLocations(Project& project)
     placeMarkersOfTheUser(project);
 }
 
+void ArdourReader::readVideo(Project& project)
+{
+    const pugi::xml_node timeline = m_root.child("Extra").child("Videotimeline");
+    const std::string name = timeline.attribute("Filename").value();
+    const auto isOldPicture = [](const Track* track) {
+        return attributeId(*track, AttributeKey::VideoType) == OldVideo;
+    };
+    if (name.empty() || std::ranges::any_of(project.allTracks(), isOldPicture))
+        return;
+    const std::string_view offset = timeline.attribute("VideoOffset").as_string("0");
+    const std::optional<SessionId> samples = idIn(offset.substr(offset.starts_with('-') ? 1 : 0));
+    if (!samples || *samples > m_session.clock.samplesOf(FurthestTime))
+        throw FileFault("Videotimeline", "begins at " + quoted(offset) + ", which is no number of samples");
+    m_session.staying.push_back("the video " + quoted(std::string_view(name)));
+    const double begin = m_session.clock.secondsOf(*samples) * (offset.starts_with('-') ? -1.0 : 1.0);
+    // The session doesn't tell how long its video is: to the end of the programme.
+    const double end = std::max(project.setEndTime(), contentEnd(project));
+    if (end <= std::max(begin, 0.0))
+        return;
+    // Ardour keeps videos of its own beside the sound. An absolute name replaces the folder.
+    const std::filesystem::path path = folderOfSession() / "videofiles" / name;
+    const auto clip = makeCounted<MediaClip>(MediaClip::Kind::Video, textOf(path.string()), end - begin);
+    setId(*clip, SessionKey::Video, 1);
+    project.pool().add(clip);
+    const Counted<Track> track = Track::create(Track::Kind::Video);
+    track->setName(u"Video");
+    setId(*track, SessionKey::Video, 1);
+    setId(*track, AttributeKey::VideoType, OldVideo);
+    const auto event = makeCounted<ClipEvent>();
+    event->setClip(clip);
+    event->setName(clip->name());
+    event->setSourceOffset(std::max(-begin, 0.0));
+    event->setSpan(std::max(begin, 0.0), end);
+    event->insertInto(*track);
+    // It stays where Ardour has it.
+    track->setLocked(true);
+    track->insertInto(project);
+}
+
 void ArdourReader::placeMarkersOfTheUser(Project& project)
 {
     const SessionClock& clock = m_session.clock;
@@ -584,7 +677,8 @@ void ArdourReader::placeOwnMarkers(Project& project)
             continue;
         const ArdourSession::Location& location = found->second;
         marker->setSpan(m_session.clock.secondsOf(location.start), m_session.clock.secondsOf(location.end));
-        marker->setName(markerName(location.name, track));
+        if (textOf(location.name) != ownLocationName(track.name(), marker->name()))
+            marker->setName(markerName(location.name, track));
         setId(*marker, SessionKey::Location, id);
         marker->insertInto(track);
     }

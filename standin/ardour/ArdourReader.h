@@ -34,8 +34,13 @@ public:
     ArdourSession takeSession() { return std::move(m_session); }
 
 private:
+    /// As every session of Ardour's is.
+    void requireUtf8() const;
+    /// A new project with what Cadrel has stored in the session, as far as that can be read.
+    Velmark::Counted<Project> readOwn(ChangeLog& log);
     void findIds();
     void findExtra();
+    std::filesystem::path folderOfSession() const;
     void readClock(Project& project);
     void readSources(Project& project);
     void readRoutes(Project& project);
@@ -49,6 +54,7 @@ private:
     void readList(SessionId route, const pugi::xml_node& list, Track& track, int number);
     void dropGoneTracks(Project& project);
     void readLocations(Project& project);
+    void readVideo(Project& project);
     void placeOwnMarkers(Project& project);
     void placeMarkersOfTheUser(Project& project);
 

@@ -6,8 +6,30 @@
 #include "standin/project/Track.h"
 
 #include <algorithm>
+#include <string_view>
 
 namespace standin {
+
+namespace {
+
+/// Whether a name begins with words, whatever letters of the Latin alphabet are large in both.
+bool beginsWith(std::u16string_view name, std::u16string_view words)
+{
+    const auto small = [](char16_t letter) {
+        return letter >= u'A' && letter <= u'Z' ? static_cast<char16_t>(letter - u'A' + u'a') : letter;
+    };
+    return std::ranges::equal(name.substr(0, words.size()), words, {}, small, small);
+}
+
+} // namespace
+
+std::u16string ownLocationName(const std::u16string& track, const std::u16string& marker)
+{
+    const std::u16string name = marker.substr(0, marker.find_last_not_of(u' ') + 1);
+    if (name.empty())
+        return track;
+    return beginsWith(name, track) ? name : track + u": " + name;
+}
 
 double contentEnd(const Project& project)
 {

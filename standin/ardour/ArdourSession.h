@@ -3,6 +3,7 @@
 #pragma once
 
 #include "standin/ardour/CurveScale.h"
+#include "standin/ardour/CutMark.h"
 #include "standin/ardour/SessionClock.h"
 #include "standin/ardour/SessionKey.h"
 #include "standin/ardour/XmlText.h"
@@ -22,11 +23,9 @@ class Project;
 /// An id in a session, under which no other object of it stands.
 using SessionId = std::int64_t;
 
-/// The name of the location that stands for a marker on a track of Cadrel's.
-inline std::u16string ownLocationName(const std::u16string& track, const std::u16string& marker)
-{
-    return marker.empty() ? track : track + u": " + marker;
-}
+/// The name of the location that stands for a marker on a track of Cadrel's: with the kind of the marker, which is the name of
+/// its track, but once.
+std::u16string ownLocationName(const std::u16string& track, const std::u16string& marker);
 
 /// The id that an attribute of a node holds; 0 without one.
 SessionId attributeId(const Node& node, const char* key);
@@ -41,10 +40,13 @@ struct ArdourSession {
 
     /// All in samples.
     struct Region {
-        TextRange text;
-        std::int64_t position;
-        std::int64_t length;
-        std::int64_t start; ///< in the source
+        TextRange text{};
+        std::int64_t position = 0;
+        std::int64_t length = 0;
+        std::int64_t start = 0; ///< in the source
+        SessionId source = 0;
+        std::optional<CutMark> head{}; ///< of an edge at which an earlier run has cut
+        std::optional<CutMark> tail{};
     };
     struct List {
         TextRange text;
@@ -78,7 +80,8 @@ struct ArdourSession {
     TextRange own;                     ///< what Cadrel has put there; empty without
     std::string ownText;               ///< in it
     std::vector<SessionId> ownMarkers; ///< the locations of the markers in that text, in their order
-    std::string ownAsRead;             ///< what would be put there for the project as it was read
+    bool isOwnBroken = false;
+    std::string ownAsRead; ///< what would be put there for the project as it was read
     /// The length of the fade at a new edge, in samples; 64 is Ardour's own.
     std::int64_t edgeFade = DefaultFade;
     std::vector<std::string> staying; ///< what no run moves, in words

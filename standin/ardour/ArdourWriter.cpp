@@ -95,13 +95,18 @@ void ArdourWriter::writePlaylist(const ArdourSession::Playlist& playlist, const 
         }
         found->second.push_back(event);
     }
-    for (const SessionId region : playlist.regions)
-        writeRegion(region, piecesOf(m_session.regions.at(region), events.at(region), m_session.clock));
+    std::vector<RegionPieces> pieces;
+    for (const SessionId id : playlist.regions) {
+        const ArdourSession::Region& region = m_session.regions.at(id);
+        pieces.push_back({region, piecesOf(region, events.at(id), m_session.clock)});
+    }
+    findSeams(pieces);
+    for (const RegionPieces& of : pieces)
+        writeRegion(of.region, of.pieces);
 }
 
-void ArdourWriter::writeRegion(SessionId id, const std::vector<RegionPiece>& pieces)
+void ArdourWriter::writeRegion(const ArdourSession::Region& region, const std::vector<RegionPiece>& pieces)
 {
-    const ArdourSession::Region& region = m_session.regions.at(id);
     if (pieces.size() == 1 && pieces.front().isAll(region))
         return;
     if (pieces.empty()) {

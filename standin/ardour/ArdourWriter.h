@@ -24,7 +24,7 @@ public:
 
 private:
     void writePlaylist(const ArdourSession::Playlist& playlist, const Track& track);
-    void writeRegion(SessionId id, const std::vector<RegionPiece>& pieces);
+    void writeRegion(const ArdourSession::Region& region, const std::vector<RegionPiece>& pieces);
     void writeLists();
     void writeList(const ArdourSession::List& list, const Envelope& curve);
     void writeLocations();

@@ -69,13 +69,16 @@ void writePoints(pugi::xml_node& list, const std::vector<ListPoint>& points, con
         appendNumber(events, value);
         events += '\n';
     };
+    std::int64_t former = -1;
     for (std::size_t first = 0; first < points.size();) {
         const std::int64_t samples = clock.samplesOf(points[first].seconds);
         std::size_t last = first;
         while (last + 1 < points.size() && clock.samplesOf(points[last + 1].seconds) == samples)
             ++last;
-        if (points[first].value != points[last].value && samples > 0)
-            append(clock.timeText(samples, 1), points[first].value);
+        const bool hasRoom = samples > 0 && (clock.hasUnits() || samples - 1 > former);
+        if (points[first].value != points[last].value && hasRoom)
+            append(clock.timeText(samples, true), points[first].value);
+        former = samples;
         append(clock.timeText(samples), points[last].value);
         first = last + 1;
     }

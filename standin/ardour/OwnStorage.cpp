@@ -16,12 +16,15 @@ namespace {
 
 bool isOfSession(const Track& track)
 {
-    return track.attributes().contains(SessionKey::Route) || track.attributes().contains(SessionKey::Markers);
+    return track.attributes().contains(SessionKey::Route) || track.attributes().contains(SessionKey::Markers) ||
+           track.attributes().contains(SessionKey::Video);
 }
 
 /// Whether something of a track would be lost that the session itself doesn't hold.
 bool hasOwn(const Track& track)
 {
+    if (track.attributes().contains(SessionKey::Video))
+        return false;
     return !isOfSession(track) || track.attributes().size() > 1 || track.isLocked();
 }
 
@@ -47,7 +50,7 @@ std::string OwnStorage::textOf(const Project& project)
     const Track* around = nullptr;
     return forXml(ProjectWriter::textOf(project, [&around](const Node& node) {
         if (const auto* const clip = dynamic_cast<const MediaClip*>(&node))
-            return clip->kind() == MediaClip::Kind::Video;
+            return clip->kind() == MediaClip::Kind::Video && !clip->attributes().contains(SessionKey::Video);
         if (const auto* const track = dynamic_cast<const Track*>(&node)) {
             around = track;
             return hasOwn(*track);

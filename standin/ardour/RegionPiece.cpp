@@ -4,15 +4,18 @@
 
 #include "standin/ardour/CurveScale.h"
 #include "standin/ardour/ListText.h"
+#include "standin/ardour/RegionFades.h"
+#include "standin/ardour/XmlText.h"
 #include "standin/project/ClipEvent.h"
 
 #include <pugixml.hpp>
 
 #include <algorithm>
 #include <cmath>
-#include <numbers>
 #include <set>
+#include <string>
 #include <string_view>
+#include <tuple>
 
 namespace standin {
 
@@ -20,158 +23,12 @@ namespace {
 
 using ListPoints = std::vector<ListPoint>;
 
-constexpr std::int64_t DefaultFade = ArdourSession::DefaultFade;
-/// Of a fade that is written: the sine of a quarter of a circle in so many steps.
-constexpr int StepsOfAFade = 16;
-
-void set(pugi::xml_node& element, const char* name, const std::string& value)
-{
-    pugi::xml_attribute attribute = element.attribute(name);
-    if (!attribute)
-        attribute = element.append_attribute(name);
-    attribute.set_value(value.c_str());
-}
-
-bool isOn(const pugi::xml_node& element, const char* name)
-{
-    return std::string_view(element.attribute(name).value()) == "1";
-}
-
-/// One end of a region: its fade and the names that go with it.
-struct FadeNames {
-    const char* active;
-    const char* isDefault;
-    const char* fade;
-    const char* inverse;
-    const char* id;
-};
-
-constexpr FadeNames FadeIn{"fade-in-active", "default-fade-in", "FadeIn", "InverseFadeIn", "fadein"};
-constexpr FadeNames FadeOut{"fade-out-active", "default-fade-out", "FadeOut", "InverseFadeOut", "fadeout"};
-
-/// In samples.
-std::int64_t fadeLength(const pugi::xml_node& element, const FadeNames& names, const SessionClock& clock)
-{
-    const pugi::xml_node list = element.child(names.fade).child("AutomationList");
-    if (isOn(element, names.isDefault) || !list)
-        return DefaultFade;
-    const ListPoints points = readPoints(list, clock);
-    return points.empty() ? DefaultFade : clock.samplesOf(points.back().seconds);
-}
-
-/// A fade of constant power over a piece's edge.
-void writeFade(pugi::xml_node& element, const FadeNames& names, std::int64_t length, const SessionClock& clock,
-               const std::function<SessionId()>& newId)
-{
-    const auto write = [&](const char* name, bool isRising) {
-        element.remove_child(name);
-        pugi::xml_node list = element.append_child(name).append_child("AutomationList");
-        list.append_attribute("automation-id").set_value(names.id);
-        list.append_attribute("id").set_value(std::to_string(newId()).c_str());
-        list.append_attribute("interpolation-style").set_value("Curved");
-        if (clock.hasUnits())
-            list.append_attribute("time-domain").set_value("AudioTime");
-        list.append_attribute("state").set_value("Off");
-        ListPoints points;
-        for (int step = 0; step <= StepsOfAFade; ++step) {
-            const double share = static_cast<double>(step) / StepsOfAFade;
-            const double value = std::sin((isRising ? share : 1.0 - share) * std::numbers::pi / 2.0);
-            points.push_back({clock.secondsOf(length) * share, value});
-        }
-        writePoints(list, points, clock);
-    };
-    const bool isIn = &names == &FadeIn;
-    write(names.fade, isIn);
-    write(names.inverse, !isIn);
-    set(element, names.isDefault, "0");
-}
-
-void stretchFade(pugi::xml_node& element, const FadeNames& names, double factor, const SessionClock& clock)
-{
-    for (const char* const name : {names.fade, names.inverse}) {
-        pugi::xml_node list = element.child(name).child("AutomationList");
-        if (!list)
-            continue;
-        ListPoints points = readPoints(list, clock);
-        for (ListPoint& point : points)
-            point.seconds *= factor;
-        writePoints(list, points, clock);
-    }
-}
-
-/// What a fade is to be after a cut, and is made at last so that both of a piece fit in it.
-class EdgeFade {
-public:
-    EdgeFade(pugi::xml_node& element, const FadeNames& names, RegionEdge edge, const SessionClock& clock)
-        : m_element(element), m_names(names), m_edge(edge), m_clock(clock)
-    {
-        if (edge == RegionEdge::Seam)
-            set(element, names.active, "0");
-        m_length = isOn(element, names.active) ? fadeLength(element, names, clock) : 0;
-    }
-
-    std::int64_t length() const { return m_length; }
-    bool isOld() const { return m_edge == RegionEdge::Old; }
-
-    /// At a new edge there is no fade of the user's any more.
-    void begin(std::int64_t length, const std::function<SessionId()>& newId)
-    {
-        if (m_edge != RegionEdge::New)
-            return;
-        m_element.remove_child(m_names.fade);
-        m_element.remove_child(m_names.inverse);
-        set(m_element, m_names.isDefault, "1");
-        set(m_element, m_names.active, length > 0 ? "1" : "0");
-        m_length = length;
-        if (length > 0 && length != DefaultFade)
-            writeFade(m_element, m_names, length, m_clock, newId);
-    }
-    void shorten(std::int64_t length, const std::function<SessionId()>& newId)
-    {
-        if (length >= m_length)
-            return;
-        if (length <= 0)
-            set(m_element, m_names.active, "0");
-        else if (isOn(m_element, m_names.isDefault) || !m_element.child(m_names.fade))
-            writeFade(m_element, m_names, length, m_clock, newId);
-        else
-            stretchFade(m_element, m_names, static_cast<double>(length) / static_cast<double>(m_length), m_clock);
-        m_length = std::max<std::int64_t>(length, 0);
-    }
-
-private:
-    pugi::xml_node& m_element;
-    const FadeNames& m_names;
-    RegionEdge m_edge;
-    const SessionClock& m_clock;
-    std::int64_t m_length = 0;
-};
-
-void cutFades(pugi::xml_node& element, const RegionPiece& piece, const SessionClock& clock, std::int64_t edgeFade,
-              const std::function<SessionId()>& newId)
-{
-    EdgeFade in(element, FadeIn, piece.head, clock);
-    EdgeFade out(element, FadeOut, piece.tail, clock);
-    // Ardour lets the fades that the user has drawn overlap.
-    if (in.isOld() && out.isOld())
-        return;
-    in.begin(edgeFade, newId);
-    out.begin(edgeFade, newId);
-    if (in.length() + out.length() <= piece.length)
-        return;
-    // What the user has drawn gives way last.
-    EdgeFade& first = in.isOld() && !out.isOld() ? out : in;
-    EdgeFade& second = &first == &in ? out : in;
-    first.shorten(std::max(piece.length - second.length(), std::min(first.length(), piece.length / 2)), newId);
-    second.shorten(piece.length - first.length(), newId);
-}
-
 /// The gain envelope counts from the start of the region.
 void cutEnvelope(pugi::xml_node& element, const ArdourSession::Region& region, const RegionPiece& piece,
                  const SessionClock& clock)
 {
     pugi::xml_node list = element.child("Envelope").child("AutomationList");
-    if (!list || (piece.head == RegionEdge::Old && piece.tail == RegionEdge::Old))
+    if (!list || (piece.start == region.start && piece.length == region.length))
         return;
     const ListPoints points = readPoints(list, clock);
     if (points.empty())
@@ -203,6 +60,43 @@ void cutEnvelope(pugi::xml_node& element, const ArdourSession::Region& region, c
     writePoints(list, cut, clock);
 }
 
+/// What a region was before the run.
+RegionPiece formerOf(const ArdourSession::Region& region)
+{
+    return {region.position, region.length, region.start, region.head ? RegionEdge::New : RegionEdge::Old,
+            region.tail ? RegionEdge::New : RegionEdge::Old};
+}
+
+struct SourcePiece {
+    SessionId source;
+    RegionPiece* piece;
+};
+
+void findSeams(const std::vector<SourcePiece>& pieces)
+{
+    // Where pieces begin and end: the source, and the places in the programme and in the source.
+    using Instant = std::tuple<SessionId, std::int64_t, std::int64_t>;
+    const auto headOf = [](const SourcePiece& of) { return Instant{of.source, of.piece->position, of.piece->start}; };
+    const auto tailOf = [](const SourcePiece& of) {
+        const std::int64_t length = of.piece->length;
+        return Instant{of.source, of.piece->position + length, of.piece->start + length};
+    };
+    std::set<Instant> heads;
+    std::set<Instant> tails;
+    for (const SourcePiece& of : pieces) {
+        if (of.piece->head == RegionEdge::New)
+            heads.insert(headOf(of));
+        if (of.piece->tail == RegionEdge::New)
+            tails.insert(tailOf(of));
+    }
+    for (const SourcePiece& of : pieces) {
+        if (of.piece->head == RegionEdge::New && tails.contains(headOf(of)))
+            of.piece->head = RegionEdge::Seam;
+        if (of.piece->tail == RegionEdge::New && heads.contains(tailOf(of)))
+            of.piece->tail = RegionEdge::Seam;
+    }
+}
+
 } // namespace
 
 std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std::vector<const ClipEvent*>& events,
@@ -210,10 +104,6 @@ std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std
 {
     std::vector<RegionPiece> pieces;
     const double formerPlace = clock.secondsOf(region.position) - clock.secondsOf(region.start);
-    // Where pieces begin and end: in the programme and in the source.
-    using Instant = std::pair<std::int64_t, std::int64_t>;
-    std::set<Instant> heads;
-    std::set<Instant> tails;
     for (const ClipEvent* const event : events) {
         const std::int64_t moved = clock.samplesOf(event->start() - (formerPlace + event->sourceOffset()));
         RegionPiece piece;
@@ -222,19 +112,37 @@ std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std
         piece.start = region.start + piece.position - moved - region.position;
         if (piece.length <= 0)
             continue;
-        heads.insert({piece.position, piece.start});
-        tails.insert({piece.position + piece.length, piece.start + piece.length});
+        if (piece.start > region.start || region.head)
+            piece.head = RegionEdge::New;
+        if (piece.start + piece.length < region.start + region.length || region.tail)
+            piece.tail = RegionEdge::New;
         pieces.push_back(piece);
     }
-    for (RegionPiece& piece : pieces) {
-        const Instant head{piece.position, piece.start};
-        const Instant tail{piece.position + piece.length, piece.start + piece.length};
-        if (piece.start > region.start)
-            piece.head = tails.contains(head) ? RegionEdge::Seam : RegionEdge::New;
-        if (tail.second < region.start + region.length)
-            piece.tail = heads.contains(tail) ? RegionEdge::Seam : RegionEdge::New;
-    }
     return pieces;
+}
+
+void findSeams(std::vector<RegionPieces>& playlist)
+{
+    std::vector<RegionPiece> former;
+    std::vector<SourcePiece> formerPlaces;
+    former.reserve(playlist.size());
+    std::vector<SourcePiece> places;
+    for (RegionPieces& of : playlist) {
+        former.push_back(formerOf(of.region));
+        formerPlaces.push_back({of.region.source, &former.back()});
+        for (RegionPiece& piece : of.pieces)
+            places.push_back({of.region.source, &piece});
+    }
+    findSeams(formerPlaces);
+    findSeams(places);
+    for (std::size_t index = 0; index < playlist.size(); ++index) {
+        const RegionPiece& before = former[index];
+        for (RegionPiece& piece : playlist[index].pieces) {
+            piece.isHeadAsBefore = piece.start == before.start && piece.head == before.head;
+            piece.isTailAsBefore =
+                piece.start + piece.length == before.start + before.length && piece.tail == before.tail;
+        }
+    }
 }
 
 void giveNewIds(pugi::xml_node& element, const std::function<SessionId()>& newId)
@@ -269,7 +177,8 @@ void cutRegion(pugi::xml_node& element, const ArdourSession::Region& region, con
     }
     if (element.attribute("whole-file"))
         set(element, "whole-file", "0");
-    cutFades(element, piece, clock, edgeFade, newId);
+    if (!piece.keepsHead() || !piece.keepsTail())
+        RegionFades(element, region, clock).cut(element, piece, edgeFade, newId);
     cutEnvelope(element, region, piece, clock);
 }
 

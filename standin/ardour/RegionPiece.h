@@ -3,11 +3,10 @@
 #pragma once
 
 #include "standin/ardour/ArdourSession.h"
+#include "standin/ardour/CutMark.h"
 
 #include <cstdint>
 #include <functional>
-#include <string>
-#include <string_view>
 #include <vector>
 
 namespace pugi {
@@ -18,13 +17,6 @@ namespace standin {
 
 class ClipEvent;
 
-/// How an edge of a piece of a region came to be.
-enum class RegionEdge {
-    Old, ///< it is that of the region
-    New, ///< the region was cut there
-    Seam ///< it was cut there, and its next piece still follows
-};
-
 /// A stretch of a region at its place in the new programme, in samples.
 struct RegionPiece {
     std::int64_t position = 0;
@@ -33,16 +25,34 @@ struct RegionPiece {
     RegionEdge head = RegionEdge::Old;
     RegionEdge tail = RegionEdge::Old;
 
+    /// Whether an edge that an earlier run has cut is of the kind that it was before this one.
+    bool isHeadAsBefore = false;
+    bool isTailAsBefore = false;
+
+    /// Whether an edge is one of the region, and is as it was.
+    bool keepsHead() const { return head == RegionEdge::Old || isHeadAsBefore; }
+    bool keepsTail() const { return tail == RegionEdge::Old || isTailAsBefore; }
     bool isAll(const ArdourSession::Region& region) const
     {
-        return position == region.position && length == region.length && start == region.start;
+        return position == region.position && length == region.length && start == region.start && keepsHead() &&
+               keepsTail();
     }
 };
 
+/// What is left of a region.
+struct RegionPieces {
+    const ArdourSession::Region& region;
+    std::vector<RegionPiece> pieces;
+};
+
 /// The pieces that play something, in the order of the events. All samples of an event are moved by the same number of
-/// samples, the nearest to how far the event has moved.
+/// samples, the nearest to how far the event has moved. Each edge at which this run or an earlier one has cut is new.
 std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std::vector<const ClipEvent*>& events,
                                   const SessionClock& clock);
+
+/// Makes seams of the new edges of a playlist where a piece goes on in another that was cut from it, in this run or before,
+/// and finds which edges are as they were.
+void findSeams(std::vector<RegionPieces>& playlist);
 
 /// Gives the lists in the element of a region other ids.
 void giveNewIds(pugi::xml_node& element, const std::function<SessionId()>& newId);

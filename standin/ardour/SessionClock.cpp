@@ -141,15 +141,15 @@ std::int64_t SessionClock::samples(std::string_view time) const
     return samplesAt(seconds(time));
 }
 
-std::int64_t SessionClock::endInSamples(std::string_view time, std::string_view length) const
+std::int64_t SessionClock::lengthInSamples(std::string_view time, std::string_view length) const
 {
     if (!isMusical(length))
-        return samples(time) + samples(length);
+        return samples(length);
     const double start = seconds(time);
     const double end = secondsAtTicks(ticksAt(start) + ticksAt(seconds(length)));
     if (!(end >= start && end <= FurthestTime))
         refuseTime(length);
-    return samplesAt(end);
+    return samplesAt(end - start);
 }
 
 std::int64_t SessionClock::samplesAt(double seconds) const
@@ -163,14 +163,14 @@ std::int64_t SessionClock::samplesOf(double seconds) const
     return static_cast<std::int64_t>(std::floor(seconds * static_cast<double>(m_sampleRate) + 0.5 + 1e-6));
 }
 
-std::string SessionClock::timeText(std::int64_t samples, std::int64_t superclocksBefore) const
+std::string SessionClock::timeText(std::int64_t samples, bool isBefore) const
 {
     if (!m_hasUnits)
-        return std::to_string(samples);
+        return std::to_string(samples - (isBefore ? 1 : 0));
     const std::int64_t whole = samples / m_sampleRate * SuperclocksPerSecond;
     // Rounded up, since Ardour rounds down to the sample.
     const std::int64_t rest = (samples % m_sampleRate * SuperclocksPerSecond + m_sampleRate - 1) / m_sampleRate;
-    return std::string("a").append(std::to_string(whole + rest - superclocksBefore));
+    return std::string("a").append(std::to_string(whole + rest - (isBefore ? 1 : 0)));
 }
 
 std::vector<double> SessionClock::bendsBetween(double start, double end) const

@@ -36,8 +36,9 @@ public:
     double seconds(std::string_view time) const;
     /// The same, down to the sample as Ardour plays it.
     std::int64_t samples(std::string_view time) const;
-    /// Where what begins at a time ends, when the length may be in other units than the time.
-    std::int64_t endInSamples(std::string_view time, std::string_view length) const;
+    /// How long what begins at a time is, when the length may be in other units than the time; down to the sample as Ardour
+    /// plays it.
+    std::int64_t lengthInSamples(std::string_view time, std::string_view length) const;
     double secondsOf(std::int64_t samples) const
     {
         return static_cast<double>(samples) / static_cast<double>(m_sampleRate);
@@ -45,9 +46,9 @@ public:
     /// The nearest sample; of two that are equally near the later one.
     std::int64_t samplesOf(double seconds) const;
 
-    /// A time as it is written; `superclocksBefore` is how much earlier than the sample, which no session before 7000 can
-    /// tell.
-    std::string timeText(std::int64_t samples, std::int64_t superclocksBefore = 0) const;
+    /// A time as it is written. `isBefore` is for the last time before the sample: a superclock earlier or, in a session that
+    /// counts samples, a sample.
+    std::string timeText(std::int64_t samples, bool isBefore = false) const;
 
     /// The times between two, in seconds, at which the tempo changes, and where a line over musical time bends.
     std::vector<double> bendsBetween(double start, double end) const;

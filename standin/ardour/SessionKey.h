@@ -10,6 +10,8 @@ namespace SessionKey {
 inline constexpr const char* Route = "Form:Route";
 inline constexpr const char* Region = "Form:Region";
 inline constexpr const char* Location = "Form:Location";
+/// Of the video and its track.
+inline constexpr const char* Video = "Form:Video";
 /// Of the track of the user's own markers.
 inline constexpr const char* Markers = "Form:Markers";
 

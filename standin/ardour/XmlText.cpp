@@ -118,6 +118,19 @@ std::string printed(const pugi::xml_node& node, unsigned depth)
     return first == std::string::npos ? std::string() : writer.text.substr(first, last + 1 - first);
 }
 
+void set(pugi::xml_node& element, const char* name, const std::string& value)
+{
+    pugi::xml_attribute attribute = element.attribute(name);
+    if (!attribute)
+        attribute = element.append_attribute(name);
+    attribute.set_value(value.c_str());
+}
+
+bool isOn(const pugi::xml_node& element, const char* name)
+{
+    return std::string_view(element.attribute(name).value()) == "1";
+}
+
 std::string withoutForbidden(std::string text)
 {
     constexpr std::string_view Replacement = "\xEF\xBF\xBD";

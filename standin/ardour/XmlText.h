@@ -33,6 +33,11 @@ unsigned depthOf(const TextRange& element, std::string_view text);
 /// An element as text, to be put where one stands so deep; without the blanks before it.
 std::string printed(const pugi::xml_node& node, unsigned depth);
 
+/// Also adds an attribute that isn't there.
+void set(pugi::xml_node& element, const char* name, const std::string& value);
+/// Whether an attribute is "1".
+bool isOn(const pugi::xml_node& element, const char* name);
+
 /// A text as XML can hold it: with U+FFFD for each character that no XML 1.0 text may have (section 2.2). It has to be UTF-8.
 std::string withoutForbidden(std::string text);
 

@@ -26,12 +26,12 @@ using Velmark::Counted;
 namespace {
 
 template <class Error = ProjectFileError>
-[[noreturn]] void fail(std::string name, const std::string& fault)
+[[noreturn]] void fail(std::string name, const std::string& fault, const std::string& remedy = {})
 {
     // A name may hold anything, but the message is one line.
     std::ranges::replace_if(
         name, [](char byte) { return (byte >= 0 && byte < 0x20) || byte == 0x7F; }, '?');
-    throw Error(name + ": " + fault);
+    throw Error(name + ": " + fault, remedy);
 }
 
 std::string contentOf(const fs::path& file)
@@ -56,6 +56,16 @@ std::string contentOf(const fs::path& file)
     if (error || !stream.is_open() || static_cast<std::size_t>(stream.gcount()) != content.size())
         fail(file.string(), "can't be read");
     return content;
+}
+
+/// Whether a name is one under which Cadrel keeps what it replaces: "reel_backup_1".
+bool isBackup(const fs::path& stem)
+{
+    constexpr std::string_view Mark = "_backup_";
+    const std::string& name = stem.native();
+    const std::size_t mark = name.rfind(Mark);
+    return mark != std::string::npos && mark + Mark.size() < name.size() &&
+           name.find_first_not_of("0123456789", mark + Mark.size()) == std::string::npos;
 }
 
 Counted<Project> parsed(std::string text, const fs::path& file, ChangeLog& log)
@@ -86,10 +96,10 @@ fs::path ProjectFile::fileIn(const fs::path& path)
     fs::path found;
     for (fs::directory_iterator entry(path, error); !error && entry != fs::directory_iterator();
          entry.increment(error)) {
-        if (entry->path().extension() != ArdourForm::Extension)
+        if (entry->path().extension() != ArdourForm::Extension || isBackup(entry->path().stem()))
             continue;
         if (!found.empty())
-            fail(path.string(), "holds several sessions; name one of them");
+            fail(path.string(), "holds several sessions", "name one of them");
         found = entry->path();
     }
     if (error)
@@ -108,7 +118,7 @@ Counted<Project> ProjectFile::read(const fs::path& file, ChangeLog& log)
             project->form()->requireFree(file);
         return project;
     } catch (const FileFault& fault) {
-        fail(file.string(), fault.what());
+        fail(file.string(), fault.what(), fault.remedy());
     }
 }
 
@@ -117,7 +127,7 @@ Counted<Project> ProjectFile::parse(std::string_view text, const std::string& na
     try {
         return parsed(std::string(text), name, log);
     } catch (const FileFault& fault) {
-        fail(name, fault.what());
+        fail(name, fault.what(), fault.remedy());
     }
 }
 
@@ -129,7 +139,7 @@ void ProjectFile::requireWritable(const Project& project, const fs::path& file)
         project.form()->requirePlace(file);
         project.form()->requireFree(file);
     } catch (const FileFault& fault) {
-        fail(file.string(), fault.what());
+        fail(file.string(), fault.what(), fault.remedy());
     }
 }
 
@@ -146,7 +156,7 @@ std::string ProjectFile::write(const Project& project, const fs::path& file, con
             form->wasWritten(file);
         return text;
     } catch (const FileFault& fault) {
-        fail(file.string(), std::string("this project can't be stored: ") + fault.what());
+        fail(file.string(), std::string("this project can't be stored: ") + fault.what(), fault.remedy());
     } catch (const FileReplacement::TargetChanged&) {
         fail<ProjectFileChanged>(file.string(), "another program has written it meanwhile");
     } catch (const cadrel::util::Result::Type&) {

@@ -11,6 +11,7 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace standin {
 
@@ -20,7 +21,16 @@ class Project;
 /// What is wrong with a project file. `what()` is one line: the file, the place in it and the fault.
 class ProjectFileError : public std::runtime_error {
 public:
-    using std::runtime_error::runtime_error;
+    explicit ProjectFileError(const std::string& fault, std::string remedy = {})
+        : std::runtime_error(fault), m_remedy(std::move(remedy))
+    {
+    }
+
+    /// What the user can do; empty where it isn't known.
+    const std::string& remedy() const { return m_remedy; }
+
+private:
+    std::string m_remedy;
 };
 
 /// Another program has written the file that a project was to replace.

@@ -30,6 +30,8 @@ public:
     virtual void requirePlace(const std::filesystem::path& file) const = 0;
     /// What there is to do beside a file that has been written.
     virtual void wasWritten(const std::filesystem::path& file) const = 0;
+    /// Whether what Cadrel has stored in the file can't be read. The next writing replaces it if there is something to store.
+    virtual bool hasBrokenStorage() const = 0;
     /// What of the file no edit of the project moves, in words.
     virtual std::vector<std::string> staying() const = 0;
     /// How long a clip fades in or out where an edit has cut it, in seconds.

@@ -6,7 +6,7 @@
 #include "standin/video/VideoError.h"
 
 #include <algorithm>
-#include <limits>
+#include <utility>
 #include <vector>
 
 namespace standin {
@@ -40,74 +40,70 @@ bool isPositive(AVRational ratio)
     return ratio.num > 0 && ratio.den > 0;
 }
 
+void refuseTooLarge(const AVFormatContext& format)
+{
+    for (unsigned index = 0; index < format.nb_streams; ++index) {
+        const AVCodecParameters& parameters = *format.streams[index]->codecpar;
+        if (isFilm(*format.streams[index]) &&
+            std::int64_t{parameters.width} * parameters.height > PictureReader::MostPixels)
+            throw VideoError(Reason::TooLarge);
+    }
+}
+
+/// Looks into the streams for what the head of the file doesn't tell.
+void findStreams(AVFormatContext& format, Deadline deadline)
+{
+    // The libraries take an array of bare dictionaries, one for each stream that is known so far.
+    std::vector<AVDictionary*> perStream(format.nb_streams);
+    for (AVDictionary*& dictionary : perStream)
+        dictionary = decoderOptions().release();
+    const int found = avformat_find_stream_info(&format, perStream.empty() ? nullptr : perStream.data());
+    for (AVDictionary* dictionary : perStream)
+        av_dict_free(&dictionary);
+    if (found < 0)
+        throwFailure(deadline);
+}
+
+/// The video; nothing else is read from then on.
+AVStream& chooseFilm(AVFormatContext& format)
+{
+    const int index = av_find_best_stream(&format, AVMEDIA_TYPE_VIDEO, -1, -1, nullptr, 0);
+    if (index < 0 || !isFilm(*format.streams[index]))
+        throw VideoError(Reason::NoPicture);
+    for (unsigned other = 0; other < format.nb_streams; ++other)
+        format.streams[other]->discard = static_cast<int>(other) == index ? AVDISCARD_DEFAULT : AVDISCARD_ALL;
+    return *format.streams[index];
+}
+
+AvOwner<AVCodecContext> openDecoder(const AVStream& stream, Deadline deadline)
+{
+    const AVCodecParameters& parameters = *stream.codecpar;
+    const AVCodec* const codec = avcodec_find_decoder(parameters.codec_id);
+    if (!codec || !isPositive(stream.time_base))
+        throw VideoError(Reason::Broken);
+    auto decoder = owned(avcodec_alloc_context3(codec));
+    if (avcodec_parameters_to_context(decoder.get(), &parameters) < 0)
+        throwFailure(deadline);
+    decoder->pkt_timebase = stream.time_base;
+    AVDictionary* options = decoderOptions().release();
+    const int error = avcodec_open2(decoder.get(), codec, &options);
+    av_dict_free(&options);
+    if (error < 0)
+        throwFailure(deadline);
+    return decoder;
+}
+
+Ratio rateOf(AVFormatContext& format, AVStream& stream)
+{
+    const AVRational guessed = av_guess_frame_rate(&format, &stream, nullptr);
+    return exactRate(isPositive(guessed) ? std::clamp(av_q2d(guessed), 0.001, 1000.0) : 25.0);
+}
+
 } // namespace
 
 PictureReader::PictureReader(const fs::path& file, Deadline deadline) : m_file(file), m_deadline(deadline)
 {
-    open();
-}
-
-void PictureReader::open()
-{
-    m_decoder.reset();
-    m_format.reset();
-    m_stream = nullptr;
-    restart();
-    m_waitsForKey = false;
-
-    m_format = openMedia(m_file, m_deadline);
-    refuseTooLarge();
-
-    // The libraries take an array of bare dictionaries, one for each stream that is known so far.
-    std::vector<AVDictionary*> perStream(m_format->nb_streams);
-    for (AVDictionary*& dictionary : perStream)
-        dictionary = decoderOptions().release();
-    const int found = avformat_find_stream_info(m_format.get(), perStream.empty() ? nullptr : perStream.data());
-    for (AVDictionary* dictionary : perStream)
-        av_dict_free(&dictionary);
-    if (found < 0)
-        throwFailure(m_deadline);
-    openDecoder();
-}
-
-void PictureReader::openDecoder()
-{
-    const int index = av_find_best_stream(m_format.get(), AVMEDIA_TYPE_VIDEO, -1, -1, nullptr, 0);
-    if (index < 0 || !isFilm(*m_format->streams[index]))
-        throw VideoError(Reason::NoPicture);
-    for (unsigned other = 0; other < m_format->nb_streams; ++other)
-        m_format->streams[other]->discard = static_cast<int>(other) == index ? AVDISCARD_DEFAULT : AVDISCARD_ALL;
-    m_stream = m_format->streams[index];
-    refuseTooLarge();
-    const AVCodecParameters& parameters = *m_stream->codecpar;
-    const AVCodec* const codec = avcodec_find_decoder(parameters.codec_id);
-    if (!codec || !isPositive(m_stream->time_base))
-        throw VideoError(Reason::Broken);
-    m_decoder = owned(avcodec_alloc_context3(codec));
-    if (avcodec_parameters_to_context(m_decoder.get(), &parameters) < 0)
-        throwFailure(m_deadline);
-    m_decoder->pkt_timebase = m_stream->time_base;
-    AVDictionary* options = decoderOptions().release();
-    const int error = avcodec_open2(m_decoder.get(), codec, &options);
-    av_dict_free(&options);
-    if (error < 0)
-        throwFailure(m_deadline);
-
-    const AVRational guessed = av_guess_frame_rate(m_format.get(), m_stream, nullptr);
-    const double rate = isPositive(guessed) ? std::clamp(av_q2d(guessed), 0.001, 1000.0) : 25.0;
-    m_rate = exactRate(rate);
-    m_frameTicks = std::max<std::int64_t>(
-        1, av_rescale_q(1, {static_cast<int>(m_rate.denominator), static_cast<int>(m_rate.numerator)},
-                        m_stream->time_base));
-}
-
-void PictureReader::refuseTooLarge() const
-{
-    for (unsigned index = 0; index < m_format->nb_streams; ++index) {
-        const AVCodecParameters& parameters = *m_format->streams[index]->codecpar;
-        if (isFilm(*m_format->streams[index]) && std::int64_t{parameters.width} * parameters.height > MostPixels)
-            throw VideoError(Reason::TooLarge);
-    }
+    rewind();
 }
 
 bool PictureReader::next(AVFrame& picture)
@@ -155,8 +151,10 @@ bool PictureReader::readPacket()
     while (true) {
         av_packet_unref(m_packet.get());
         const int error = av_read_frame(m_format.get(), m_packet.get());
-        if (isLate())
+        if (error < 0 && isLate()) {
+            m_hasLostItsPlace = true;
             throw VideoError(Reason::TooSlow);
+        }
         if (error < 0)
             return false;
         if (m_packet->stream_index != m_stream->index)
@@ -183,6 +181,7 @@ void PictureReader::decide(const AVPacket& packet)
 
 bool PictureReader::seek(std::int64_t ticks)
 {
+    m_hasLostItsPlace = true;
     if (av_seek_frame(m_format.get(), m_stream->index, ticks, AVSEEK_FLAG_BACKWARD) < 0) {
         if (isLate())
             throw VideoError(Reason::TooSlow);
@@ -196,11 +195,28 @@ bool PictureReader::seek(std::int64_t ticks)
 
 void PictureReader::rewind()
 {
-    open();
+    // What can't be opened again leaves the reader whole.
+    auto format = openMedia(m_file, m_deadline);
+    refuseTooLarge(*format);
+    findStreams(*format, m_deadline);
+    AVStream& stream = chooseFilm(*format);
+    refuseTooLarge(*format);
+    auto decoder = openDecoder(stream, m_deadline);
+
+    m_rate = rateOf(*format, stream);
+    m_frameTicks = std::max<std::int64_t>(
+        1,
+        av_rescale_q(1, {static_cast<int>(m_rate.denominator), static_cast<int>(m_rate.numerator)}, stream.time_base));
+    m_decoder = std::move(decoder);
+    m_format = std::move(format);
+    m_stream = &stream;
+    restart();
+    m_waitsForKey = false;
 }
 
 void PictureReader::restart()
 {
+    m_hasLostItsPlace = false;
     m_isDrained = false;
     m_entry.reset();
     m_leaveOutBefore.reset();
@@ -240,6 +256,8 @@ PictureReader::Tail PictureReader::readTail()
 {
     Tail tail;
     while (readPacket()) {
+        if (isLate())
+            throw VideoError(Reason::TooSlow);
         // A file that was cut short may end within a picture.
         if ((m_packet->flags & (AV_PKT_FLAG_CORRUPT | AV_PKT_FLAG_DISCARD)) != 0)
             continue;

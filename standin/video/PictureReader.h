@@ -25,15 +25,17 @@ public:
     PictureReader(const PictureReader&) = delete;
     PictureReader& operator=(const PictureReader&) = delete;
 
-    /// All that takes longer ends as TooSlow. What comes next is undefined then until a `rewind` or a `seek`.
+    /// All that takes longer ends as TooSlow.
     void setDeadline(Deadline deadline) { m_deadline = deadline; }
+    /// Whether what comes next isn't known, after a failure; a `rewind` or a `seek` tells it again.
+    bool hasLostItsPlace() const { return m_hasLostItsPlace; }
 
     /// Its time is what `timeOf` says. False at the end of the file.
     bool next(AVFrame& picture);
     /// Sets it to a key picture that was stored at or before that time, as far as the file tells. The pictures that are shown
     /// before that key picture are left out, since they may need others that come before it. False when it can't be done.
     bool seek(std::int64_t ticks);
-    /// Sets it to the start.
+    /// Sets it to the start, and opens the file anew for it.
     void rewind();
     /// The end of the last picture, in ticks. Moves the place.
     std::int64_t findEnd();
@@ -56,9 +58,6 @@ public:
     AVStream& stream() const { return *m_stream; }
 
 private:
-    void open();
-    void openDecoder();
-    void refuseTooLarge() const;
     bool isLate() const { return std::chrono::steady_clock::now() >= m_deadline; }
     /// Gives the decoder what comes next, which may be the end.
     void feed();
@@ -83,6 +82,7 @@ private:
     AvOwner<AVPacket> m_packet = owned(av_packet_alloc());
     Ratio m_rate;
     std::int64_t m_frameTicks = 1;
+    bool m_hasLostItsPlace = false;
     bool m_isDrained = false;            ///< the end of the file has been told to the decoder
     bool m_waitsForKey = false;          ///< after a seek
     std::optional<std::int64_t> m_entry; ///< of the key picture at which it began after a seek

@@ -65,12 +65,15 @@ IThumbnailImage* VideoThumbnailFactory::getImage(uint32 frame)
         Picture picture = read(file, frame, std::chrono::steady_clock::now() + MostTime);
         return makeCounted<ThumbnailImage>(picture.size.width, picture.size.height, std::move(picture.pixels)).detach();
     } catch (const VideoError& error) {
+        // What takes too long goes on at the next request.
+        if (error.reason() != VideoError::Reason::TooSlow)
+            m_file.reset();
         reason = error.what();
     } catch (const std::exception&) {
         // Such as a lack of memory, or a path that can't be one.
+        m_file.reset();
         reason = "The picture can't be read.";
     }
-    m_file.reset();
     const auto lines =
         ThumbnailImage::linesOf(paragraphsOf(m_caption, reason.c_str(), places), m_size.width, m_size.height);
     return makeCounted<ThumbnailImage>(m_size.width, m_size.height, lines).detach();
@@ -93,7 +96,6 @@ Picture VideoThumbnailFactory::read(const fs::path& file, uint32 frame, Deadline
             if (FileStamp::of(file) == stamp)
                 return picture;
         } catch (const VideoError&) {
-            m_file.reset();
             if (FileStamp::of(file) == stamp)
                 throw;
         }

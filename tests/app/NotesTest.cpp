@@ -859,6 +859,11 @@ TEST(Notes, TheTitlesOfTheCutsTellFilesOfOneNameApart)
 
     EXPECT_EQ(text.find("Titles      REEL 3 V07 to REEL 3 V12\n"), 0U) << text;
     EXPECT_NE(text.find("Old cut, reel3.edl, event 2 (AX)"), std::string::npos) << text;
+    EXPECT_NE(contentOf(folder / "notes.html").find("<title>Change notes: REEL 3 V07 to REEL 3 V12</title>"),
+              std::string::npos);
+    notes({"-o", folder / "notes.pdf"});
+    EXPECT_NE(unbroken(textOfPdf(folder / "notes.pdf")).find("REEL 3 V07 to REEL 3 V12 page 1 of 1"),
+              std::string::npos);
     EXPECT_NE(
         contentOf(folder / "notes.html").find("<p class=\"titles\"><bdi>REEL 3 V07</bdi> to <bdi>REEL 3 V12</bdi></p>"),
         std::string::npos);
@@ -971,6 +976,107 @@ TEST(Notes, ACutHasNothingToTellOfItself)
 
     EXPECT_EQ(outcome.status, 0);
     EXPECT_NE(outcome.out.find("\nNothing has changed.\n"), std::string::npos) << outcome.out;
+}
+
+TEST(Notes, EqualTitlesDoNotTellTheCutsApart)
+{
+    const Cuts film("TITLE: REEL 3\n" + oldCut(), "TITLE: REEL 3\n" + newCut());
+
+    EXPECT_NE(film.file(".html").find("<title>Change notes: old.edl to new.edl</title>"), std::string::npos);
+    film.file(".pdf");
+    EXPECT_NE(unbroken(textOfPdf(film.folder / "notes.pdf")).find(" old.edl to new.edl page 1 of "), std::string::npos);
+}
+
+TEST(Notes, WhereNothingHasChangedALineThatWasPassedOverInOneCutAloneIsPointedTo)
+{
+    const std::string shot = cut("002", "A", "10:00:00:00 10:00:10:00", "00:00:00:00 00:00:10:00");
+    // It ends at midnight, where the day begins anew.
+    const std::string leader = cut("001", "LEADER", "00:00:00:00 00:00:08:00", "23:59:52:00 00:00:00:00");
+    const Cuts withLeader(shot, leader + shot);
+    const Cuts same(leader + shot, leader + shot);
+    const std::vector<std::string> rate{"--rate", "24 fps"};
+    const std::string hint = "Nothing has changed in what could be read; see below.";
+
+    const std::string text = withLeader.notes(rate).out;
+    EXPECT_NE(text.find("\n" + hint + "\n"), std::string::npos) << text;
+    EXPECT_NE(text.find("passed over", text.find(hint)), std::string::npos) << text;
+    EXPECT_NE(withLeader.file(".html", rate).find("<p>" + hint + "</p>"), std::string::npos);
+    withLeader.file(".pdf", rate);
+    EXPECT_NE(unbroken(textOfPdf(withLeader.folder / "notes.pdf")).find(hint), std::string::npos);
+    EXPECT_NE(same.notes(rate).out.find("\nNothing has changed.\n"), std::string::npos);
+    EXPECT_NE(Cuts(shot, shot + "001  AX V C 10:00:00:00\n").notes(rate).out.find("\n" + hint + "\n"),
+              std::string::npos);
+}
+
+/// Reels of one shot of so many minutes, at these minutes.
+std::string reelsAt(const std::vector<std::pair<int, int>>& reels)
+{
+    const auto time = [](int minutes) {
+        const std::string text = std::to_string(100 + minutes % 60);
+        return std::string("0")
+            .append(std::to_string(minutes / 60))
+            .append(":")
+            .append(text.substr(1))
+            .append(":00:00");
+    };
+    std::string film;
+    for (std::size_t reel = 0; reel < reels.size(); ++reel) {
+        const auto [start, length] = reels[reel];
+        film +=
+            cut(std::string("00").append(std::to_string(reel + 1)), std::string("R").append(std::to_string(reel + 1)),
+                time(0) + " " + time(length), time(start) + " " + time(start + length));
+    }
+    return film;
+}
+
+TEST(Notes, AReelInTheWayOfAnEarlierOneIsMovedByAStepOfThat)
+{
+    const Cuts film(reelsAt({{60, 4}, {70, 4}}), reelsAt({{60, 12}, {80, 4}}));
+    const std::vector<std::string> rate{"--rate", "24 fps"};
+
+    const std::string text = film.notes(rate).out;
+    const json notes = json::parse(film.file(".json", rate));
+
+    EXPECT_NE(unbroken(text).find("Reels are moved as a whole in such an order that none ever lies on another"),
+              std::string::npos)
+        << text;
+    EXPECT_NE(text.find("   1  01:10:00:00  move all of reel 2 to 01:20:00:00                 00:00:00:00\n"
+                        "      00:10:00:00 later                  the whole reel\n"),
+              std::string::npos)
+        << text;
+    EXPECT_NE(text.find("\nReel 2, 01:20:00:00, began at 01:10:00:00, moved by step 1\n"
+                        "00:04:00:00 before and after\n"),
+              std::string::npos)
+        << text;
+    const json& step = notes.at("reels")[0].at("rows")[0];
+    EXPECT_EQ(step.at("from"), json::parse(R"({"reel": 2, "timecode": "01:10:00:00", "frame": 0})"));
+    EXPECT_EQ(step.at("at"), json::parse(R"({"reel": 2, "timecode": "01:20:00:00", "frame": 0})"));
+    EXPECT_FALSE(step.at("changes")[0].contains("outOfTheWay"));
+    EXPECT_NE(film.file(".csv", rate)
+                  .find("\n1,1,move-reel,01:20:00:00,01:10:00:00,,,,0,0,0,0,0,reel-moved,,,"
+                        "01:10:00:00,01:20:00:00,the whole reel: 00:10:00:00 later,0+00,0+00,2,2,"),
+              std::string::npos);
+}
+
+TEST(Notes, AReelThatWaitsAtAFreePlaceSaysSo)
+{
+    const std::string first = cut("001", "A", "00:00:00:00 00:04:00:00", "01:00:00:00 01:04:00:00");
+    const std::string second = cut("002", "B", "00:00:00:00 00:04:00:00", "01:10:00:00 01:14:00:00");
+    const Cuts film(first + second, cut("001", "B", "00:00:00:00 00:04:00:00", "01:00:00:00 01:04:00:00") +
+                                        cut("002", "A", "00:00:00:00 00:04:00:00", "01:10:00:00 01:14:00:00"));
+    const std::vector<std::string> rate{"--rate", "24 fps"};
+
+    const std::string text = film.notes(rate).out;
+    const json notes = json::parse(film.file(".json", rate));
+
+    EXPECT_NE(text.find("   1  01:00:00:00  move all of reel 2 to 01:20:00:00                 00:00:00:00\n"
+                        "      00:20:00:00 later                  the whole reel\n"
+                        "        out of the way until its own steps\n"),
+              std::string::npos)
+        << text;
+    EXPECT_NE(text.find("   3  01:20:00:00  move all of reel 2 to 01:10:00:00 "), std::string::npos) << text;
+    EXPECT_EQ(notes.at("reels")[0].at("rows")[0].at("changes")[0].at("outOfTheWay"), true);
+    EXPECT_EQ(text.find("moved by step"), std::string::npos) << text;
 }
 
 TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)

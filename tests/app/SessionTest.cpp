@@ -122,6 +122,56 @@ TEST_F(Session, IsLeftAloneWhileArdourHasUnsavedWork)
     EXPECT_EQ(regionsOf(file).size(), 1U);
 }
 
+TEST_F(Session, TellsWhatToDoWhenItCannotBeTaken)
+{
+    folder.write("reel.pending", "<Session/>");
+    EXPECT_NE(apply({"--in-place"})
+                  .err.find("in place of this session; open the session in Ardour and save it, or remove "
+                            "that file\n"),
+              std::string::npos);
+    std::filesystem::remove(folder.path() / "reel.pending");
+    folder.write("other.ardour", contentOf(file));
+    const Outcome several = runCadrel({"show", folder.path().string()});
+    EXPECT_NE(several.err.find("holds several sessions; name one of them\n"), std::string::npos) << several.err;
+}
+
+TEST_F(Session, CanBeginAnewWhereWhatEarlierRunsHaveStoredIsBroken)
+{
+    ASSERT_EQ(apply({"-o", output}).status, 0);
+    std::string text = contentOf(output);
+    const std::size_t stored = text.find("<Cadrel version");
+    ASSERT_NE(stored, std::string::npos);
+    text.replace(text.find('>', stored) + 1, 1, "x");
+    const std::string broken = folder.write("broken.ardour", text);
+    const std::string again = (folder.path() / "again.ardour").string();
+    const auto applyBack = [&](std::vector<std::string> more) {
+        std::vector<std::string> arguments{"apply", broken, "--old", newEdl, "--new", oldEdl, "-o", again};
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        return runCadrel(arguments);
+    };
+    const Outcome stopped = applyBack({});
+    EXPECT_EQ(stopped.status, 1);
+    EXPECT_NE(stopped.err.find("Cadrel's data in it is damaged; take an intact copy, or begin anew with --fresh"),
+              std::string::npos)
+        << stopped.err;
+    const Outcome fresh = applyBack({"--fresh"});
+    EXPECT_EQ(fresh.status, 0) << fresh.err;
+    EXPECT_EQ(runCadrel({"show", again}).out.find("damaged"), std::string::npos);
+    EXPECT_NE(runCadrel({"show", broken}).out.find("damaged"), std::string::npos);
+}
+
+TEST_F(Session, ShowsItsVideoAsTheOldPicture)
+{
+    std::string text = contentOf(file);
+    text.insert(text.find("</Session>"), R"(<Extra><Videotimeline Filename="reel.mov" VideoOffset="0"/></Extra>)");
+    const std::string film = folder.write("film.ardour", text);
+    const Outcome shown = runCadrel({"show", film});
+    EXPECT_NE(shown.out.find("Cadrel's track: Old Video"), std::string::npos) << shown.out;
+    const Outcome outcome = runCadrel({"apply", film, "--old", oldEdl, "--new", newEdl, "-o", output, "--summary"});
+    EXPECT_EQ(outcome.status, 0) << outcome.err;
+    EXPECT_NE(contentOf(output).find(R"(<Videotimeline Filename="reel.mov" VideoOffset="0"/>)"), std::string::npos);
+}
+
 TEST_F(Session, HasFadesOfTheLengthThatIsAskedFor)
 {
     EXPECT_EQ(apply({"-o", output, "--fade", "10"}).status, 0);

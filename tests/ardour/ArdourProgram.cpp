@@ -82,14 +82,25 @@ bool ArdourProgram::isInstalled()
     return run("sh -c 'command -v ardour7-lua && command -v ardour7-export'").status == 0;
 }
 
-void ArdourProgram::make(const fs::path& folder, const std::string& name, int tracks)
+void ArdourProgram::make(const fs::path& folder, const std::string& name, int tracks, int sampleRate, bool withBus)
 {
-    lua("make.lua", folder, name, "TRACKS=" + std::to_string(tracks));
+    lua("make.lua", folder, name,
+        "TRACKS=" + std::to_string(tracks) + " RATE=" + std::to_string(sampleRate) + (withBus ? " WITHBUS=1" : ""));
 }
 
 void ArdourProgram::automate(const fs::path& folder, const std::string& name, const std::string& points)
 {
     lua("automate.lua", folder, name, "POINTS='" + points + "'");
+}
+
+void ArdourProgram::draw(const fs::path& folder, const std::string& name, const std::string& drawn)
+{
+    lua("draw.lua", folder, name, "DRAWN='" + drawn + "'");
+}
+
+void ArdourProgram::resave(const fs::path& folder, const std::string& name)
+{
+    lua("resave.lua", folder, name, "");
 }
 
 ArdourDump ArdourProgram::dump(const fs::path& folder, const std::string& name,

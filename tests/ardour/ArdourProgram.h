@@ -36,10 +36,15 @@ class ArdourProgram {
 public:
     static bool isInstalled();
 
-    /// `name` is without extension, for all calls.
-    static void make(const std::filesystem::path& folder, const std::string& name, int tracks);
-    /// `points` is a list of "what:sample:value", for all tracks. The session is saved by Ardour.
+    /// `name` is without extension, for all calls. With a bus each track sends to it and obeys a VCA, and the tempo changes.
+    static void make(const std::filesystem::path& folder, const std::string& name, int tracks, int sampleRate,
+                     bool withBus);
+    /// `points` is a list of "what:sample:value", as scripts/automate.lua takes it. The session is saved by Ardour.
     static void automate(const std::filesystem::path& folder, const std::string& name, const std::string& points);
+    /// `drawn` is a list of fades and envelopes, as scripts/draw.lua takes it. The session is saved by Ardour.
+    static void draw(const std::filesystem::path& folder, const std::string& name, const std::string& drawn);
+    /// Opens the session and saves it.
+    static void resave(const std::filesystem::path& folder, const std::string& name);
     static ArdourDump dump(const std::filesystem::path& folder, const std::string& name,
                            const std::vector<std::int64_t>& samples);
     /// The left channel of the mix over the session range.

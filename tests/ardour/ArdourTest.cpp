@@ -4,12 +4,17 @@
 
 #include "tests/ardour/ArdourProgram.h"
 #include "tests/ardour/ConformedSession.h"
+#include "tests/support/TreePaths.h"
 
 #include <gtest/gtest.h>
+#include <pugixml.hpp>
 
 #include <algorithm>
 #include <cmath>
+#include <filesystem>
+#include <random>
 #include <set>
+#include <sstream>
 
 namespace cadrel::tests {
 
@@ -17,8 +22,13 @@ namespace {
 
 constexpr const char* New = "conformed";
 
+constexpr const char* Old = ConformedSession::Name;
+
 /// Moves, trims, a new shot and a doubled one.
 const Recut Film{250, {{100, 40}, {0, 37}, {-1, 25}, {37, 60}, {150, 100}, {20, 15}}};
+/// The same and its way back, where no shot is lost.
+const Recut Swapped{250, {{90, 160}, {0, 90}}};
+const Recut SwappedBack{250, {{160, 90}, {0, 160}}};
 
 class InArdour : public testing::Test {
 protected:
@@ -42,12 +52,13 @@ std::vector<std::pair<std::string, std::int64_t>> playedAt(const ArdourDump& dum
     return played;
 }
 
-/// The samples at which something may begin or end in a programme, and those beside them.
-std::set<std::int64_t> samplesToTry(const ArdourDump& dump, const Recut& recut)
+/// The samples at which something may begin or end in a programme, and those so far beside them.
+std::set<std::int64_t> samplesToTry(const ArdourDump& dump, const Recut& recut,
+                                    const std::vector<std::int64_t>& besides = {-1, 0, 1, 500})
 {
     std::set<std::int64_t> samples;
     const auto add = [&](std::int64_t sample) {
-        for (const std::int64_t beside : {-1, 0, 1, 500})
+        for (const std::int64_t beside : besides)
             samples.insert(std::max<std::int64_t>(sample + beside, 0));
     };
     for (const ArdourDump::Region& region : dump.regions) {
@@ -63,103 +74,395 @@ std::set<std::int64_t> samplesToTry(const ArdourDump& dump, const Recut& recut)
 /// Before the conform the pan's list counts in beats, and Ardour rounds a sample to one of 1,920 ticks of a quarter.
 constexpr double OfATick = 5e-5;
 
-TEST_F(InArdour, EachRegionAndEachValueStandsWhereItsPictureWent)
+/// Samples of a new programme and where they stood in the old one.
+struct Samples {
+    std::vector<std::int64_t> fresh;
+    std::vector<std::int64_t> former;
+
+    explicit Samples(const Recut& recut)
+    {
+        const auto add = [&](std::int64_t sample) {
+            if (sample < 0 || recut.sourceOf(sample) < 0)
+                return;
+            fresh.push_back(sample);
+            former.push_back(recut.sourceOf(sample));
+        };
+        for (std::int64_t sample = 7; sample < recut.edges().back(); sample += 2977)
+            add(sample);
+        for (const std::int64_t edge : recut.edges()) {
+            add(edge - 1);
+            add(edge);
+        }
+    }
+};
+
+void expectTheSameValues(const ArdourDump& after, const ArdourDump& before, const Samples& samples)
 {
-    const ConformedSession session("law", Film, 8, 25,
-                                   "gain:0:1 gain:100000:0.25 gain:200000:1 gain:300000:0.7 gain:400000:0 "
-                                   "pan:50000:0.1 pan:250000:0.9 mute:0:0 mute:150000:1 mute:190000:0");
-    session.conform(New);
-
-    std::vector<std::int64_t> newSamples;
-    std::vector<std::int64_t> oldSamples;
-    for (std::int64_t sample = 7; sample < Film.edges().back(); sample += 2977) {
-        if (Film.sourceOf(sample) >= 0) {
-            newSamples.push_back(sample);
-            oldSamples.push_back(Film.sourceOf(sample));
+    std::set<std::pair<std::string, std::string>> lists;
+    for (const auto& [key, value] : before.values)
+        lists.emplace(std::get<0>(key), std::get<1>(key));
+    for (const auto& [track, what] : lists) {
+        for (std::size_t index = 0; index < samples.fresh.size(); ++index) {
+            ASSERT_NEAR(after.values.at({track, what, samples.fresh[index]}),
+                        before.values.at({track, what, samples.former[index]}), what == "pan" ? OfATick : 1e-5)
+                << track << " " << what << " at " << samples.fresh[index] << " from " << samples.former[index];
         }
     }
-    for (const std::int64_t edge : Film.edges()) {
-        for (const std::int64_t sample : {edge - 1, edge}) {
-            if (sample >= 0 && Film.sourceOf(sample) >= 0) {
-                newSamples.push_back(sample);
-                oldSamples.push_back(Film.sourceOf(sample));
-            }
-        }
-    }
-    const ArdourDump before = ArdourProgram::dump(session.folder(), ConformedSession::Name, oldSamples);
-    const ArdourDump after = ArdourProgram::dump(session.folder(), New, newSamples);
+}
 
-    EXPECT_EQ(after.complaints, before.complaints);
-    ASSERT_EQ(before.regions.size(), 200U);
+void expectTheSameRegions(const ArdourDump& after, const ArdourDump& before, const Recut& recut)
+{
     std::set<std::string> tracks;
     for (const ArdourDump::Region& region : before.regions)
         tracks.insert(region.track);
-    ASSERT_EQ(tracks.size(), 8U);
     for (const std::string& track : tracks) {
-        for (const std::int64_t sample : samplesToTry(after, Film)) {
-            const std::int64_t source = Film.sourceOf(sample);
+        for (const std::int64_t sample : samplesToTry(after, recut)) {
+            const std::int64_t source = recut.sourceOf(sample);
             const auto expected = source < 0 ? playedAt(after, "", 0) : playedAt(before, track, source);
             ASSERT_EQ(playedAt(after, track, sample), expected) << track << " at " << sample;
         }
-        for (std::size_t index = 0; index < newSamples.size(); ++index) {
-            for (const std::string what : {"gain", "pan", "mute"}) {
-                ASSERT_NEAR(after.values.at({track, what, newSamples[index]}),
-                            before.values.at({track, what, oldSamples[index]}), what == "pan" ? OfATick : 1e-5)
-                    << track << " " << what << " at " << newSamples[index] << " from " << oldSamples[index];
-            }
-        }
     }
 }
 
-TEST_F(InArdour, MarksMoveAndTheSessionEndsWithTheProgramme)
-{
-    const ConformedSession session("marks", Film, 1, 20, "gain:0:1");
-    session.conform(New);
-    const ArdourDump before = ArdourProgram::dump(session.folder(), ConformedSession::Name, {});
-    const ArdourDump after = ArdourProgram::dump(session.folder(), New, {});
-    std::multiset<std::pair<std::string, std::int64_t>> expected;
-    std::int64_t begin = 0;
-    for (const Recut::Shot& shot : Film.shots) {
-        for (const auto& [name, start, end] : before.locations) {
-            const std::int64_t from = shot.from * Recut::SamplesAFrame;
-            if (name.starts_with("mark") && shot.from >= 0 && start >= from &&
-                start < from + shot.length * Recut::SamplesAFrame)
-                expected.emplace(name, begin + start - from);
-        }
-        begin += shot.length * Recut::SamplesAFrame;
-    }
-    std::multiset<std::pair<std::string, std::int64_t>> found;
-    for (const auto& [name, start, end] : after.locations) {
-        if (name.starts_with("mark"))
-            found.emplace(name, start);
-    }
-    EXPECT_EQ(found, expected);
-    EXPECT_FALSE(found.empty());
-}
+/// How far two mixes may differ.
+constexpr double Inaudible = 1e-6;
 
-TEST_F(InArdour, TheNewMixIsTheOldOneAtItsSourcePlace)
+/// Compares a mix with what it was made from, but for so many samples on both sides of each edge. Returns how loud it is.
+double expectTheSameMix(const std::vector<float>& after, const std::vector<float>& before, const Recut& recut,
+                        std::int64_t beside)
 {
-    const ConformedSession session("mix", Film, 4, 6, "pan:0:0.5");
-    session.conform(New);
-    const std::vector<float> before = ArdourProgram::mix(session.folder(), ConformedSession::Name);
-    const std::vector<float> after = ArdourProgram::mix(session.folder(), New);
-    const std::vector<std::int64_t> edges = Film.edges();
-    constexpr std::int64_t Beside = 48000 * 30 / 1000;
+    const std::vector<std::int64_t> edges = recut.edges();
     std::int64_t compared = 0;
     double loudest = 0.0;
     for (std::int64_t sample = 0; sample < std::ssize(after) && sample < edges.back(); ++sample) {
         const bool isNearEdge =
-            std::ranges::any_of(edges, [&](std::int64_t edge) { return std::abs(sample - edge) < Beside; });
-        const std::int64_t source = Film.sourceOf(sample);
+            std::ranges::any_of(edges, [&](std::int64_t edge) { return std::abs(sample - edge) < beside; });
+        const std::int64_t source = recut.sourceOf(sample);
         if (isNearEdge || source >= std::ssize(before))
             continue;
         const float expected = source < 0 ? 0.0F : before[static_cast<std::size_t>(source)];
-        ASSERT_NEAR(after[static_cast<std::size_t>(sample)], expected, 1e-6) << sample << " from " << source;
+        EXPECT_NEAR(after[static_cast<std::size_t>(sample)], expected, Inaudible) << sample << " from " << source;
+        if (testing::Test::HasFailure())
+            break;
         loudest = std::max<double>(loudest, std::abs(expected));
         ++compared;
     }
     EXPECT_GT(compared, edges.back() / 2);
-    EXPECT_GT(loudest, 0.01);
+    return loudest;
+}
+
+constexpr std::int64_t Beside = 48000 * 30 / 1000;
+
+TEST_F(InArdour, EachRegionAndEachValueStandsWhereItsPictureWent)
+{
+    const ConformedSession session("law", Film,
+                                   {.tracks = 8,
+                                    .regionsATrack = 25,
+                                    .points = "gain:0:1 gain:100000:0.25 gain:200000:1 gain:300000:0.7 gain:400000:0 "
+                                              "pan:50000:0.1 pan:250000:0.9 mute:0:0 mute:150000:1 mute:190000:0"});
+    session.conform(New);
+    const Samples samples(Film);
+    const ArdourDump before = ArdourProgram::dump(session.folder(), Old, samples.former);
+    const ArdourDump after = ArdourProgram::dump(session.folder(), New, samples.fresh);
+    EXPECT_EQ(after.complaints, before.complaints);
+    ASSERT_EQ(before.regions.size(), 200U);
+    expectTheSameRegions(after, before, Film);
+    expectTheSameValues(after, before, samples);
+}
+
+TEST_F(InArdour, TrimSendsBussesAndVcasFollowThePictureThroughChangesOfTheTempo)
+{
+    const ConformedSession session(
+        "routes", Film,
+        {.tracks = 2,
+         .regionsATrack = 3,
+         .withBus = true,
+         .points = "gain:0:1 gain:170000:0.25 trim:30000:0.2 trim:180000:4 trim:390000:1 send:0:0.3 send:200000:1 "
+                   "pan:20000:0.2 pan:130000:0.9 pan:380000:0.1 bus:0:1 bus:250000:0.1 vca:60000:0.2 vca:300000:1"});
+    session.conform(New);
+    const Samples samples(Film);
+    const ArdourDump before = ArdourProgram::dump(session.folder(), Old, samples.former);
+    const ArdourDump after = ArdourProgram::dump(session.folder(), New, samples.fresh);
+    EXPECT_EQ(after.complaints, before.complaints);
+    for (const auto& [track, what] :
+         {std::pair("Dia 1", "send"), std::pair("Bus 1", "gain"), std::pair("VCA", "gain")}) {
+        ASSERT_TRUE(before.values.contains({track, what, samples.former.front()})) << track << " " << what;
+        EXPECT_NE(before.values.at({track, what, samples.former.front()}),
+                  before.values.at({track, what, samples.former.back()}));
+    }
+    expectTheSameValues(after, before, samples);
+}
+
+TEST_F(InArdour, TracksThatShareAPlaylistStillShareItAndItMovesOnce)
+{
+    const ConformedSession session("shared", Film, {.tracks = 2, .regionsATrack = 10});
+    const std::filesystem::path file = session.file(Old);
+    pugi::xml_document document;
+    ASSERT_TRUE(document.load_file(file.c_str()));
+    const auto routeOf = [&](const char* name) {
+        return document.document_element().child("Routes").find_child_by_attribute("Route", "name", name);
+    };
+    routeOf("Dia 2").attribute("audio-playlist") = routeOf("Dia 1").attribute("audio-playlist").value();
+    document.document_element()
+        .child("Playlists")
+        .find_child_by_attribute("Playlist", "id", routeOf("Dia 1").attribute("audio-playlist").value())
+        .attribute("shared-with-ids") = routeOf("Dia 2").attribute("id").value();
+    document.save_file(file.c_str());
+    ArdourProgram::resave(session.folder(), Old);
+    session.conform(New);
+    const ArdourDump before = ArdourProgram::dump(session.folder(), Old, {});
+    const ArdourDump after = ArdourProgram::dump(session.folder(), New, {});
+    EXPECT_EQ(after.complaints, before.complaints);
+    ASSERT_EQ(before.regions.size(), 20U);
+    expectTheSameRegions(after, before, Film);
+}
+
+/// The film at other rates of picture and sound, from an hour of timecode on.
+class AtRate : public InArdour, public testing::WithParamInterface<int> {};
+
+TEST_P(AtRate, EachRegionStandsAtTheSampleThatIsNearestToItsPicture)
+{
+    constexpr int AnHour = 107892;
+    const Recut film{250, Film.shots, {GetParam(), "timecode_2997drop", 30, true, AnHour}};
+    const ConformedSession session("rate", film, {.tracks = 2, .regionsATrack = 20});
+    session.conform(New);
+    const ArdourDump before = ArdourProgram::dump(session.folder(), Old, {});
+    const ArdourDump after = ArdourProgram::dump(session.folder(), New, {});
+    EXPECT_EQ(after.complaints, before.complaints);
+    ASSERT_EQ(before.regions.size(), 40U);
+    // A frame needn't begin at a sample, so that an edge may lie one sample beside, and what is played, too.
+    for (const std::string track : {"Dia 1", "Dia 2"}) {
+        for (const std::int64_t sample : samplesToTry(after, film, {-3, 3, 500})) {
+            const std::int64_t source = film.sourceOf(sample);
+            const auto played = playedAt(after, track, sample);
+            const auto expected = source < 0 ? playedAt(after, "", 0) : playedAt(before, track, source);
+            const bool isNearEdge = playedAt(before, track, source - 2) != playedAt(before, track, source + 2) &&
+                                    playedAt(before, track, source - 2).size() != expected.size();
+            if (isNearEdge || playedAt(before, track, source + 2).size() != expected.size())
+                continue;
+            ASSERT_EQ(played.size(), expected.size()) << track << " at " << sample;
+            for (std::size_t index = 0; index < played.size(); ++index) {
+                ASSERT_EQ(played[index].first, expected[index].first) << track << " at " << sample;
+                ASSERT_NEAR(static_cast<double>(played[index].second), static_cast<double>(expected[index].second), 1.0)
+                    << track << " at " << sample;
+            }
+        }
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Sound, AtRate, testing::Values(44100, 48000, 96000),
+                         [](const auto& rate) { return "Of" + std::to_string(rate.param); });
+
+TEST_F(InArdour, MarksMoveAndTheSessionEndsWithTheProgramme)
+{
+    const ConformedSession session("marks", Film, {.regionsATrack = 20, .points = "gain:0:1"});
+    session.conform(New);
+    const ArdourDump before = ArdourProgram::dump(session.folder(), Old, {});
+    const ArdourDump after = ArdourProgram::dump(session.folder(), New, {});
+    std::multiset<std::pair<std::string, std::int64_t>> expected;
+    int begin = 0;
+    for (const Recut::Shot& shot : Film.shots) {
+        const std::int64_t from = Film.clock.sampleOf(shot.from);
+        for (const auto& [name, start, end] : before.locations) {
+            if (name.starts_with("mark") && shot.from >= 0 && start >= from &&
+                start < from + Film.clock.sampleOf(shot.length))
+                expected.emplace(name, Film.clock.sampleOf(begin) + start - from);
+        }
+        begin += shot.length;
+    }
+    std::multiset<std::pair<std::string, std::int64_t>> found;
+    std::int64_t end = 0;
+    for (const auto& [name, start, last] : after.locations) {
+        if (name.starts_with("mark"))
+            found.emplace(name, start);
+        if (name == "session")
+            end = last;
+    }
+    EXPECT_EQ(found, expected);
+    EXPECT_FALSE(found.empty());
+    EXPECT_EQ(end, Film.edges().back());
+}
+
+TEST_F(InArdour, TheNewMixIsTheOldOneAtItsSourcePlace)
+{
+    const ConformedSession session("mix", Film, {.tracks = 4, .regionsATrack = 6, .points = "pan:0:0.5"});
+    session.conform(New);
+    const std::vector<float> before = ArdourProgram::mix(session.folder(), Old);
+    const std::vector<float> after = ArdourProgram::mix(session.folder(), New);
+    EXPECT_GT(expectTheSameMix(after, before, Film, Beside), 0.01);
+}
+
+/// A long region below, another one over it whose fades are so long that most cuts of the film lie in them, and two that
+/// follow one another in a crossfade, one of them with a gain envelope.
+const SessionPlan Drawn{.regionsATrack = 4,
+                        .places = {{0, 479000}, {20000, 420000}, {100000, 150000}, {230000, 200000}},
+                        .loudest = 500,
+                        .drawn = "take 0.1:in:FadeConstantPower:200000;take 0.1:out:FadeSlow:150000;"
+                                 "take 0.2:out:FadeLinear:20000;take 0.3:in:FadeSymmetric:20000;"
+                                 "take 0.2:envelope:0:1;take 0.2:envelope:60000:0.25;take 0.2:envelope:150000:1.5;"};
+
+TEST_F(InArdour, ACutInALongFadeOrAnEnvelopeLeavesTheSoundAsItWas)
+{
+    const ConformedSession session("fades", Film, Drawn);
+    session.conform(New);
+    const std::vector<float> before = ArdourProgram::mix(session.folder(), Old);
+    const std::vector<float> after = ArdourProgram::mix(session.folder(), New);
+    EXPECT_GT(expectTheSameMix(after, before, Film, Beside), 0.001);
+}
+
+TEST_F(InArdour, FadesThatOverlapInOneRegionSoundTheSameInItsPieces)
+{
+    SessionPlan plan{.places = {{1000, 470000}}, .loudest = 500};
+    plan.drawn = "take 0.0:in:FadeConstantPower:300000;take 0.0:out:FadeLinear:300000;";
+    const ConformedSession session("overlap", Film, plan);
+    session.conform(New);
+    const std::vector<float> before = ArdourProgram::mix(session.folder(), Old);
+    const std::vector<float> after = ArdourProgram::mix(session.folder(), New);
+    EXPECT_GT(expectTheSameMix(after, before, Film, Beside), 0.001);
+}
+
+TEST_F(InArdour, ASecondRunThatTakesTheCutBackLeavesNoFadeWhereThePiecesMeetAgain)
+{
+    const ConformedSession session("back", Swapped, Drawn);
+    session.conform(New);
+    ArdourProgram::resave(session.folder(), New);
+    session.conformAgain(New, SwappedBack, "back");
+    const ArdourDump once = ArdourProgram::dump(session.folder(), New, {});
+    const ArdourDump twice = ArdourProgram::dump(session.folder(), "back", {});
+    EXPECT_EQ(twice.complaints, once.complaints);
+    // The markers of the first run are gone.
+    const auto destinations = [](const ArdourDump& dump) {
+        return std::ranges::count_if(dump.locations, [](const ArdourDump::Location& location) {
+            return std::get<0>(location).starts_with("Destination");
+        });
+    };
+    EXPECT_EQ(destinations(once), 2);
+    EXPECT_EQ(destinations(twice), 2);
+    const std::vector<float> before = ArdourProgram::mix(session.folder(), Old);
+    const std::vector<float> after = ArdourProgram::mix(session.folder(), "back");
+    EXPECT_GT(expectTheSameMix(after, before, {250, {{0, 250}}}, 0), 0.001);
+}
+
+TEST_F(InArdour, ARunAfterArdourHasSavedTheSessionCarriesItOver)
+{
+    const ConformedSession session(
+        "again", Swapped, {.tracks = 3, .regionsATrack = 12, .points = "gain:0:1 gain:200000:0.25 mute:90000:1"});
+    session.conform(New);
+    ArdourProgram::resave(session.folder(), New);
+    session.conformAgain(New, Film, "next");
+    const Samples samples(Film);
+    const ArdourDump before = ArdourProgram::dump(session.folder(), New, samples.former);
+    const ArdourDump after = ArdourProgram::dump(session.folder(), "next", samples.fresh);
+    EXPECT_EQ(after.complaints, before.complaints);
+    expectTheSameRegions(after, before, Film);
+    expectTheSameValues(after, before, samples);
+}
+
+TEST_F(InArdour, WhatItHasSavedOpensThereAfterAnotherCut)
+{
+    // A cut of 5 s from an hour of timecode on, as the sessions were carried over.
+    const Recut first{125, {{60, 40}, {0, 60}, {-1, 10}, {100, 25}}, {.firstFrame = 90000}};
+    const std::filesystem::path folder =
+        std::filesystem::temp_directory_path() / ("cadrel-saved-" + std::to_string(std::random_device()()));
+    std::filesystem::create_directories(folder);
+    for (const std::string name : {"film", "conformed"}) {
+        std::filesystem::copy_file(treePath("tests/data/ardour/" + name + ".ardour"), folder / (name + ".ardour"));
+        const Recut next{name == "film" ? 125 : 135, {{30, 80}, {0, 30}}, first.clock};
+        ConformedSession::apply(folder, name, name == "film" ? first.oldEdl() : first.newEdl(),
+                                name == "film" ? next.newEdl() : first.followedBy(next).newEdl(), "next");
+        const ArdourDump before = ArdourProgram::dump(folder, name, {});
+        const ArdourDump after = ArdourProgram::dump(folder, "next", {});
+        EXPECT_EQ(after.complaints, before.complaints);
+        EXPECT_FALSE(after.regions.empty());
+        for (const std::string track : {"Dia 1", "Dia 2"}) {
+            for (const std::int64_t sample : samplesToTry(after, next))
+                EXPECT_EQ(playedAt(after, track, sample), playedAt(before, track, next.sourceOf(sample)))
+                    << name << " " << track << " at " << sample;
+        }
+    }
+    std::filesystem::remove_all(folder);
+}
+
+/// Rewrites a session as Ardour 6 did, whose times are plain samples.
+void makeVersion6000(const std::filesystem::path& file)
+{
+    pugi::xml_document document;
+    ASSERT_TRUE(document.load_file(file.c_str()));
+    pugi::xml_node session = document.document_element();
+    const auto plain = [](const std::string& time) { return std::to_string(std::stoll(time.substr(1)) / 5880); };
+    session.attribute("version") = "6000";
+    for (pugi::xml_node route : session.child("Routes").children("Route"))
+        route.attribute("version") = "6000";
+    for (const pugi::xpath_node& found : document.select_nodes("//Region")) {
+        pugi::xml_node region = found.node();
+        const std::string length = region.attribute("length").value();
+        const std::size_t at = length.find('@');
+        region.attribute("length") = plain(length.substr(0, at)).c_str();
+        region.append_attribute("position") = plain(length.substr(at + 1)).c_str();
+        for (const char* const name : {"start", "sync-position"})
+            region.attribute(name) = plain(region.attribute(name).value()).c_str();
+        for (const char* const name : {"ancestral-start", "ancestral-length"})
+            region.attribute(name) = "0";
+        region.append_attribute("positional-lock-style") = "AudioTime";
+    }
+    for (const pugi::xpath_node& found : document.select_nodes("//Location")) {
+        for (const char* const name : {"start", "end"})
+            found.node().attribute(name) = plain(found.node().attribute(name).value()).c_str();
+    }
+    for (const pugi::xpath_node& found : document.select_nodes("//AutomationList")) {
+        pugi::xml_node list = found.node();
+        list.remove_attribute("time-domain");
+        std::istringstream events(list.child("events").text().get());
+        std::string converted;
+        for (std::string time, value; events >> time >> value;)
+            converted += plain(time) + " " + value + "\n";
+        if (!converted.empty())
+            list.child("events").text() = converted.c_str();
+    }
+    pugi::xml_node tempos = session.child("TempoMap");
+    tempos.remove_children();
+    tempos.remove_attributes();
+    const auto add = [&tempos](const char* name, const std::vector<std::pair<const char*, const char*>>& attributes) {
+        pugi::xml_node node = tempos.append_child(name);
+        for (const auto& [attribute, value] : attributes)
+            node.append_attribute(attribute) = value;
+    };
+    add("Tempo", {{"pulse", "0"},
+                  {"frame", "0"},
+                  {"movable", "0"},
+                  {"lock-style", "AudioTime"},
+                  {"beats-per-minute", "120"},
+                  {"end-beats-per-minute", "120"},
+                  {"note-type", "4"},
+                  {"clamped", "0"},
+                  {"active", "1"},
+                  {"locked-to-meter", "1"}});
+    add("Meter", {{"pulse", "0"},
+                  {"frame", "0"},
+                  {"movable", "0"},
+                  {"lock-style", "AudioTime"},
+                  {"bbt", "1|1|0"},
+                  {"beat", "0"},
+                  {"note-type", "4"},
+                  {"divisions-per-bar", "4"}});
+    document.save_file(file.c_str());
+}
+
+TEST_F(InArdour, ASessionOfVersion6000IsCarriedOver)
+{
+    SessionPlan plan = Drawn;
+    plan.points = "gain:0:1 gain:200000:0.25 mute:90000:1";
+    const ConformedSession session("six", Film, plan);
+    const Samples samples(Film);
+    const ArdourDump before = ArdourProgram::dump(session.folder(), Old, samples.former);
+    makeVersion6000(session.file(Old));
+    session.conform(New);
+    pugi::xml_document written;
+    ASSERT_TRUE(written.load_file(session.file(New).c_str()));
+    EXPECT_STREQ(written.document_element().attribute("version").value(), "6000");
+    const ArdourDump after = ArdourProgram::dump(session.folder(), New, samples.fresh);
+    expectTheSameRegions(after, before, Film);
+    expectTheSameValues(after, before, samples);
 }
 
 } // namespace

@@ -2,7 +2,7 @@
 
 // The law of previews, for random projects and whatever the user does meanwhile: once the last one has ended, each of the
 // user's tracks has the bytes that it had before, and beside them what the user himself has laid there, what he has made of
-// copies, and his automation.
+// copies, and his automation. No curve of the film has been bent.
 
 #include "host/project/Project.h"
 #include "tests/host/RandomRun.h"
@@ -13,6 +13,9 @@
 #include <nlohmann/json.hpp>
 #include <rapidcheck/gtest.h>
 
+#include <algorithm>
+#include <cmath>
+#include <map>
 #include <set>
 #include <string>
 #include <utility>
@@ -34,55 +37,27 @@ public:
             run.includeOverhanging();
         // The change list stays the same, whatever is undone.
         m_film = filmOf(tracks());
+        for (standin::Track* const track : run.usersTracks()) {
+            for (const auto& [number, curve] : track->curves())
+                m_courses.try_emplace({track, number}, courseOf(*curve));
+        }
         m_end = run.project.getEnd(nullptr);
     }
 
     void takeStep()
     {
-        switch (m_chance.below(15)) {
+        switch (m_chance.below(4)) {
         case 0:
-            run.adapter->setPreviewActive(true);
+            goBackOrForth();
             break;
         case 1:
-        case 2:
-        case 3:
-            preview();
-            break;
-        case 4:
-            endPreviews();
-            break;
-        case 5:
-            run.adapter->endPreview();
-            break;
-        case 6:
-            lay();
-            break;
-        case 7:
-            for (std::uint64_t count = 1 + m_chance.below(3); count > 0; --count)
-                run.application.edits().undo(run.project);
-            break;
-        case 8:
-            for (std::uint64_t count = 1 + m_chance.below(3); count > 0 && !isRunNext(); --count)
-                run.application.edits().redo(run.project);
-            break;
-        case 9:
-            if (m_chance.oneIn(2))
-                reopen();
-            else
-                moveOrigin();
-            break;
-        case 10:
-            runAndUndo();
-            break;
-        case 11:
-        case 12:
-            editCopy();
-            break;
-        case 13:
-            addPoint();
+            edit();
             break;
         default:
-            failToPreview();
+            const std::set<Place> level = unbent();
+            letTheSystemWork();
+            const std::set<Place> after = unbent();
+            RC_ASSERT(std::ranges::includes(after, level));
         }
     }
 
@@ -91,9 +66,12 @@ public:
 
     void endPreviews()
     {
+        const std::set<Place> level = unbent();
         run.adapter->setPreviewActive(false);
         // What an edit that failed has left.
         run.adapter->endPreview();
+        const std::set<Place> after = unbent();
+        RC_ASSERT(std::ranges::includes(after, level));
     }
 
     void expectAllAsBefore()
@@ -123,7 +101,10 @@ public:
         for (std::size_t index = 0; index < now.size(); ++index)
             takePoints(index, now[index], laid);
         RC_ASSERT(laid == laidByUser());
-        expectSame(now, m_film);
+        json before = m_film;
+        for (json& track : before)
+            takePoints(0, track, laid);
+        expectSame(now, before);
         if (m_laid.empty())
             RC_ASSERT(run.project.getEnd(nullptr) == m_end);
         RC_ASSERT(run.project.hasAttribute(AttributeKey::ProjectEnd) != ResultOk);
@@ -134,6 +115,91 @@ public:
     RandomRun run;
 
 private:
+    /// A curve.
+    using Place = std::pair<standin::Track*, std::int32_t>;
+    /// Its values all over the film.
+    using Course = std::vector<double>;
+
+    void letTheSystemWork()
+    {
+        switch (m_chance.below(9)) {
+        case 0:
+            run.adapter->setPreviewActive(true);
+            break;
+        case 1:
+        case 2:
+        case 3:
+            preview();
+            break;
+        case 4:
+            endPreviews();
+            break;
+        case 5:
+            run.adapter->endPreview();
+            break;
+        case 6:
+            if (m_chance.oneIn(2))
+                reopen();
+            else
+                moveOrigin();
+            break;
+        case 7:
+            runAndUndo();
+            break;
+        default:
+            failToPreview();
+        }
+    }
+    void goBackOrForth()
+    {
+        const bool isBack = m_chance.oneIn(2);
+        for (std::uint64_t count = 1 + m_chance.below(3); count > 0; --count) {
+            if (isBack)
+                run.application.edits().undo(run.project);
+            else if (!isRunNext())
+                run.application.edits().redo(run.project);
+        }
+    }
+    void edit()
+    {
+        switch (m_chance.below(6)) {
+        case 0:
+            lay();
+            break;
+        case 1:
+        case 2:
+            editCopy();
+            break;
+        case 3:
+        case 4:
+            addPoint();
+            break;
+        default:
+            editPoint();
+        }
+    }
+
+    static Course courseOf(const standin::Envelope& curve)
+    {
+        Course values;
+        for (double time = 0.0; time < EndOfFilm; time += 12.5)
+            values.push_back(curve.valueBehind(time).value_or(-1.0));
+        return values;
+    }
+    /// The curves that run in the film as they did at first.
+    std::set<Place> unbent()
+    {
+        std::set<Place> same;
+        for (standin::Track* const track : run.usersTracks()) {
+            for (const auto& [number, curve] : track->curves()) {
+                const auto isSame = [](double a, double b) { return std::abs(a - b) < 1e-6; };
+                const auto before = m_courses.find({track, number});
+                if (before != m_courses.end() && std::ranges::equal(courseOf(*curve), before->second, isSame))
+                    same.insert({track, number});
+            }
+        }
+        return same;
+    }
     static void expectSame(const json& now, const json& before)
     {
         RC_ASSERT(now.size() == before.size());
@@ -258,7 +324,8 @@ private:
         m_laid.push_back({entry, describe(index, name, copy->start(), copy->end())});
         RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
     }
-    /// Automation of the user's, before a preview or in its stretch, on a curve on which nothing has been written.
+    /// Automation of the user's, before a preview or in its stretch: on a curve of the film, on which the system writes, or
+    /// on one of his own.
     void addPoint()
     {
         const Tracks user = run.usersTracks();
@@ -272,32 +339,92 @@ private:
         const auto [index, track] = m_chance.oneOf(fitting);
         const std::string name = Laid + std::to_string(m_laid.size());
         const std::u16string entry(name.begin(), name.end());
-        const double time = Day * static_cast<double>(m_chance.below(3)) + 2.0 * EndOfFilm +
-                            static_cast<double>(m_chance.below(2000)) + static_cast<double>(m_laid.size()) / 64.0;
+        const double time = someTime() + static_cast<double>(m_laid.size()) / 64.0;
+        const auto own = UsersCurve + static_cast<std::int32_t>(m_laid.size());
+        const std::int32_t number =
+            m_chance.oneIn(3) ? own : 1 + static_cast<std::int32_t>(m_chance.below(UsersCurve - 1));
         const auto point = makeCounted<standin::AutomationPoint>();
         point->setName(entry);
         point->setSpan(time, time);
         point->setValue(0.75);
         standin::EditService& edits = run.application.edits();
         RC_ASSERT(edits.begin(true) == ResultOk);
-        point->insertInto(track->curve(UsersCurve + static_cast<std::int32_t>(m_laid.size())));
+        point->insertInto(track->curve(number));
         RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
         m_laid.push_back({entry, describe(index, name, time, 0.75)});
     }
-    /// Moves the points of the user's from a stored track to what is laid; there are no others on his curves.
+    /// After the film: among what a preview shows, or anywhere.
+    double someTime()
+    {
+        const double offset = run.adapter->getRunState().previewOffset - run.project.timeOrigin();
+        const double shown = offset + static_cast<double>(m_chance.below(150));
+        const double anywhere =
+            Day * static_cast<double>(m_chance.below(3)) + 2.0 * EndOfFilm + static_cast<double>(m_chance.below(2000));
+        return m_chance.oneIn(2) && shown > 2.0 * EndOfFilm && shown < 20.0 * Day ? shown : anywhere;
+    }
+    /// Makes a point that the system has written the user's own: he moves it, or gives it another value.
+    void editPoint()
+    {
+        const Tracks user = run.usersTracks();
+        std::vector<std::pair<std::size_t, standin::AutomationPoint*>> points;
+        for (std::size_t index = 0; index < user.size(); ++index) {
+            for (const auto& [number, curve] : user[index]->curves()) {
+                for (auto* point = curve->firstPoint(); point; point = curve->pointBehind(*point)) {
+                    const std::string name = ConstString(point->getName()).text8();
+                    if (point->start() > 2.0 * EndOfFilm && !name.starts_with(Laid))
+                        points.emplace_back(index, point);
+                }
+            }
+        }
+        if (points.empty())
+            return;
+        const auto [index, point] = m_chance.oneOf(points);
+        const std::string name = Laid + std::to_string(m_laid.size());
+        const std::u16string entry(name.begin(), name.end());
+        standin::EditService& edits = run.application.edits();
+        RC_ASSERT(edits.begin(true) == ResultOk);
+        point->setName(entry);
+        if (m_chance.oneIn(2)) {
+            const double time = point->start() + 1.0 + static_cast<double>(m_chance.below(40)) / 8.0;
+            point->setSpan(time, time);
+        } else {
+            point->setValue(point->value() > 0.5 ? 0.203125 : 0.796875);
+        }
+        m_laid.push_back({entry, describe(index, name, point->start(), point->value())});
+        RC_ASSERT(edits.commit(&run.project, entry.c_str()) == ResultOk);
+    }
+    /// Moves the points of the user's from a stored track to what is laid, and takes those out that only keep the film level.
     static void takePoints(std::size_t track, json& stored, std::multiset<std::string>& laid)
     {
         const auto curves = stored.find("curves");
         if (curves == stored.end())
             return;
         json others = json::array();
-        for (const json& curve : *curves) {
-            if (curve["number"] < UsersCurve) {
-                others.push_back(curve);
-                continue;
+        for (json curve : *curves) {
+            json film = json::array();
+            std::vector<double> before;
+            bool keepsLevel = false;
+            for (const json& point : curve["points"]) {
+                const double value = point["value"];
+                if (nameOf(point).starts_with(Laid)) {
+                    laid.insert(describe(track, nameOf(point), point["time"], value));
+                    keepsLevel = false;
+                } else if (point["time"] < EndOfFilm) {
+                    film.push_back(point);
+                } else {
+                    // What is drawn before it afterwards may have another value.
+                    RC_ASSERT(
+                        std::ranges::any_of(before, [&](double level) { return std::abs(level - value) < 1e-6; }));
+                    RC_ASSERT(!keepsLevel);
+                    keepsLevel = true;
+                }
+                before.push_back(value);
             }
-            for (const json& point : curve["points"])
-                laid.insert(describe(track, nameOf(point), point["time"], point["value"]));
+            // One that keeps the film level has something of the user's after it.
+            RC_ASSERT(!keepsLevel);
+            curve["points"] = film;
+            if (!film.empty())
+                others.push_back(curve);
         }
         if (others.empty())
             stored.erase("curves");
@@ -400,6 +527,7 @@ private:
     Chance& m_chance;
     std::vector<ByUser> m_laid;
     json m_film;
+    std::map<Place, Course> m_courses; ///< in the film, at first
     double m_end = 0.0;
 };
 
@@ -411,7 +539,7 @@ RC_GTEST_PROP(HostPreviewLaw, LeavesEachByteOfTheUsersWhateverHeDoesMeanwhile, (
     RandomPreviews previews(chance);
     RC_PRE(canRun(previews.run));
 
-    for (std::uint64_t count = 2 + chance.below(12); count > 0; --count) {
+    for (std::uint64_t count = 2 + chance.below(14); count > 0; --count) {
         previews.takeStep();
         previews.expectFilm();
     }

@@ -84,6 +84,34 @@ protected:
         host.edit(u"Move", [&] { requireOk(event->setStart(nullptr, 0, Day + host.inHost(time))); });
     }
 
+    using Curve = standin::Envelope::Curve;
+    /// Of that of the preview, in seconds of the film.
+    static constexpr double StartOfDay = Day - 3600.0;
+    /// In seconds of the film.
+    using Points = std::vector<std::pair<double, float>>;
+    /// To the thousandth of a second.
+    Points pointsOf(int32 curve)
+    {
+        Points points;
+        for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, curve))) {
+            const double time = point->getStart(nullptr) - host.inHost(0.0);
+            points.emplace_back(std::round(time * 1000.0) / 1000.0, query<IAutomationPoint>(point)->getValue());
+        }
+        return points;
+    }
+    /// At a time of the preview.
+    void drawPoint(int32 curve, double time, float value)
+    {
+        host.addPoint(track, curve, Day + host.inHost(time), value);
+    }
+    /// Of the volume, in the film.
+    Points drawFade()
+    {
+        host.addPoint(track, Curve::Volume, host.inHost(5.0), 0.5F);
+        host.addPoint(track, Curve::Volume, host.inHost(7.0), 0.25F);
+        return pointsOf(Curve::Volume);
+    }
+
     const Texts film{"one 0-10", "two 10-20"};
     Node memos;
 };
@@ -222,14 +250,6 @@ TEST_P(HostPreviewStretchTest, LeavesWhatTheUserHasLaidOnTopOfOneAnotherInItsOrd
 
 TEST_P(HostPreviewStretchTest, LeavesTheAutomationThatTheUserDrawsOnACurveOnWhichItHasWrittenNothing)
 {
-    using Curve = standin::Envelope::Curve;
-    using Points = std::vector<std::pair<double, float>>;
-    const auto pointsOf = [&](int32 number) {
-        Points points;
-        for (const Node& point : standin::tests::childrenOf(*host.curveOf(track, number)))
-            points.emplace_back(point->getStart(nullptr), query<IAutomationPoint>(point)->getValue());
-        return points;
-    };
     host.addPoint(track, Curve::Volume, host.inHost(5.0), 0.5F);
     host.addPoint(track, Curve::Volume, host.inHost(7.0), 0.25F);
     const Points before = pointsOf(Curve::Volume);
@@ -237,9 +257,9 @@ TEST_P(HostPreviewStretchTest, LeavesTheAutomationThatTheUserDrawsOnACurveOnWhic
         SCOPED_TRACE(number);
         previewAll();
         ASSERT_GT(pointsOf(Curve::Volume).size(), before.size());
-        const double offset = previewOffset() - host.origin;
-        host.addPoint(track, number, offset + 3603.0, 0.25F);
-        host.addPoint(track, number, offset + 3630.0, 0.75F);
+        const double day = previewOffset() - 86400.0;
+        drawPoint(number, day + 3.0, 0.25F);
+        drawPoint(number, day + 30.0, 0.75F);
         const Points drawn = pointsOf(number);
         if (isReopened)
             reopen();
@@ -249,6 +269,155 @@ TEST_P(HostPreviewStretchTest, LeavesTheAutomationThatTheUserDrawsOnACurveOnWhic
         EXPECT_EQ(pointsOf(number), drawn);
         EXPECT_EQ(pointsOf(Curve::Volume), before);
     }
+}
+
+//     film       ..5|``\7__________________|
+//     preview                      |_______10|``15\17___ w: what it writes; the user draws at 2, 12, 16 and 300
+TEST_P(HostPreviewStretchTest, LeavesTheAutomationThatTheUserDrawsAmongItsOwn)
+{
+    const Points before = drawFade();
+    for (const bool isReopened : {false, true}) {
+        SCOPED_TRACE(isReopened);
+        previewAll();
+        ASSERT_EQ(
+            pointsOf(Curve::Volume),
+            (Points{{5, 0.5F}, {7, 0.25F}, {Day + 10, 0.25F}, {Day + 10, 0.5F}, {Day + 15, 0.5F}, {Day + 17, 0.25F}}));
+        for (const auto& [time, value] : {std::pair(2.0, 0.75F), {12.0, 0.125F}, {16.0, 0.875F}, {300.0, 0.5F}})
+            drawPoint(Curve::Volume, time, value);
+        if (isReopened)
+            reopen();
+
+        adapter().setPreviewActive(false);
+
+        // One at the begin of the day keeps the film level.
+        const Points kept{{5, 0.5F},          {7, 0.25F},         {StartOfDay, 0.25F}, {Day + 2, 0.75F},
+                          {Day + 12, 0.125F}, {Day + 16, 0.875F}, {Day + 300, 0.5F}};
+        EXPECT_EQ(pointsOf(Curve::Volume), kept);
+        EXPECT_EQ(host.contentOf(track), film);
+        while (pointsOf(Curve::Volume) != before)
+            ASSERT_TRUE(host.undo());
+        adapter().setPreviewActive(false);
+    }
+}
+
+TEST_P(HostPreviewStretchTest, LeavesPointsOfItsOwnThatTheUserHasMovedOrGivenAnotherValue)
+{
+    drawFade();
+    const Points rest{{5, 0.5F}, {7, 0.25F}, {StartOfDay, 0.25F}};
+    using Change = std::function<void(IProjectNode&)>;
+    const std::vector<std::pair<Change, Points>> changes{
+        {[](IProjectNode& point) { query<IAutomationPoint>(&point)->setValue(0.625F); }, {{Day + 15, 0.625F}}},
+        {[&](IProjectNode& point) { point.setStart(nullptr, 0, Day + host.inHost(15.5)); }, {{Day + 15.5, 0.5F}}}};
+    for (const auto& [change, left] : changes) {
+        previewAll();
+        const Node point = standin::tests::childrenOf(*host.curveOf(track, Curve::Volume))[4];
+        host.edit(u"Automation", [&, &edit = change] { edit(*point); });
+
+        adapter().setPreviewActive(false);
+
+        Points expected = rest;
+        expected.insert(expected.end(), left.begin(), left.end());
+        EXPECT_EQ(pointsOf(Curve::Volume), expected);
+        while (pointsOf(Curve::Volume).size() > 2)
+            ASSERT_TRUE(host.undo());
+        adapter().setPreviewActive(false);
+    }
+}
+
+TEST_P(HostPreviewStretchTest, KeepsTheFilmLevelAtWhatItsLastPointHasBeenGivenMeanwhile)
+{
+    drawFade();
+    previewAll();
+    const Node last = standin::tests::childrenOf(*host.curveOf(track, Curve::Volume))[1];
+    host.edit(u"Automation", [&] { requireOk(query<IAutomationPoint>(last)->setValue(0.75F)); });
+    drawPoint(Curve::Volume, 12.0, 0.125F);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(pointsOf(Curve::Volume), (Points{{5, 0.5F}, {7, 0.75F}, {StartOfDay, 0.75F}, {Day + 12, 0.125F}}));
+}
+
+TEST_P(HostPreviewStretchTest, NeedsNoPointToKeepTheFilmLevelWhereItIsSoWithoutOne)
+{
+    drawFade();
+    // What the user draws goes on as the film ends, or the film has no automation any more.
+    for (const bool isFilmEmpty : {false, true}) {
+        SCOPED_TRACE(isFilmEmpty);
+        previewAll();
+        drawPoint(Curve::Volume, 12.0, 0.25F);
+        drawPoint(Curve::Volume, 13.0, 0.5F);
+        Points expected{{5, 0.5F}, {7, 0.25F}, {Day + 12, 0.25F}, {Day + 13, 0.5F}};
+        if (isFilmEmpty) {
+            host.edit(u"Automation", [&] {
+                for (int count = 0; count < 2; ++count) {
+                    const Node curve = host.curveOf(track, Curve::Volume);
+                    requireOk(host.transaction()->remove(curve.get(), standin::tests::childrenOf(*curve)[0].get()));
+                }
+            });
+            expected.erase(expected.begin(), expected.begin() + 2);
+        }
+
+        adapter().setPreviewActive(false);
+
+        EXPECT_EQ(pointsOf(Curve::Volume), expected);
+        while (pointsOf(Curve::Volume).size() != 2 || pointsOf(Curve::Volume)[0].first > Day)
+            ASSERT_TRUE(host.undo());
+        adapter().setPreviewActive(false);
+    }
+}
+
+TEST_P(HostPreviewStretchTest, KeepsTheFilmLevelBeforeWhatTheUserDrawsAtTheVeryBeginOfItsDay)
+{
+    drawFade();
+    previewAll();
+    drawPoint(Curve::Volume, StartOfDay - Day, 0.75F);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(pointsOf(Curve::Volume), (Points{{5, 0.5F}, {7, 0.25F}, {StartOfDay, 0.25F}, {StartOfDay, 0.75F}}));
+}
+
+TEST_P(HostPreviewStretchTest, KeepsTheUsersAutomationWhenItsEndIsRefusedAtFirst)
+{
+    drawFade();
+    previewAll();
+    drawPoint(Curve::Volume, 12.0, 0.125F);
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->deletes = false;
+    host.altered.replace(IEditService::iid, edits);
+    EXPECT_NE(adapter().endPreview(), Result::Ok);
+    host.altered.unhide(IEditService::iid);
+    EXPECT_EQ(pointsOf(Curve::Volume).back(), (std::pair{Day + 12, 0.125F}));
+
+    EXPECT_EQ(adapter().endPreview(), Result::Ok);
+
+    EXPECT_EQ(pointsOf(Curve::Volume), (Points{{5, 0.5F}, {7, 0.25F}, {StartOfDay, 0.25F}, {Day + 12, 0.125F}}));
+    EXPECT_EQ(host.contentOf(track), film);
+}
+
+TEST_P(HostPreviewStretchTest, OfAnEarlierProjectLeavesAutomationPastTheEndOfItsOwnTrack)
+{
+    drawFade();
+    previewAll();
+    // Another track reaches further.
+    const double start = previewOffset() - host.origin;
+    const Node other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"copy", Day + 0.0, Day + 60.0);
+    const auto store = [&](const Node& node, double end) {
+        writeNumbers(host.context(), *node, AttributeKey::Preview, {start, host.inHost(end)});
+        node->removeAttribute(AttributeKey::PreviewEvents);
+        node->removeAttribute(AttributeKey::PreviewCurves);
+    };
+    store(other, Day + 60.0);
+    store(track, Day + 20.0);
+    drawPoint(Curve::Volume, 12.0, 0.125F);
+    drawPoint(Curve::Volume, 20.1, 0.75F);
+    drawPoint(Curve::Volume, 50.0, 0.125F);
+
+    adapter().setPreviewActive(false);
+
+    EXPECT_EQ(pointsOf(Curve::Volume),
+              (Points{{5, 0.5F}, {7, 0.25F}, {StartOfDay, 0.25F}, {Day + 20.1, 0.75F}, {Day + 50, 0.125F}}));
 }
 
 TEST_P(HostPreviewStretchTest, GivesWayToWhatTheUserHasLaidSinceThePreviewBefore)
@@ -597,7 +766,7 @@ TEST_P(HostPreviewStretchTest, BendsNoCurveWhereAnotherTrackKeepsAnEarlierRecord
         Texts found;
         for (const Node& point : standin::tests::childrenOf(*host.curveOf(other, volume))) {
             const double time = point->getStart(nullptr) - host.inHost(0.0);
-            if (time < Day - 1.0)
+            if (time < StartOfDay)
                 found.push_back(std::to_string(time) + " " +
                                 std::to_string(query<IAutomationPoint>(point)->getValue()));
         }

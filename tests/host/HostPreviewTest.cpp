@@ -641,6 +641,38 @@ TEST_P(HostPreviewTest, GoesBackToThePreviewBeforeOnceThatIsAnEntry)
     EXPECT_TRUE(adapter().isPreviewActive());
 }
 
+TEST_P(HostPreviewTest, GoesBackToThePreviewThatARedoHasBroughtBackSinceItWasSwitchedOn)
+{
+    previewAll();
+    const Texts shown = host.contentOf(track);
+    ASSERT_TRUE(host.undo());
+    adapter().setPreviewActive(true);
+    ASSERT_TRUE(host.redo());
+    ASSERT_EQ(host.contentOf(track), shown);
+    host.preview(firstChange());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_EQ(host.contentOf(track), shown);
+    EXPECT_TRUE(adapter().isPreviewActive());
+}
+
+TEST_P(HostPreviewTest, GoesBackToWhenItWasOffAlsoWhereAnotherChangeIsUndoneSinceItWasSwitchedOn)
+{
+    adapter().setPreviewActive(true);
+    {
+        const auto command = adapter().createCommand(L"Delete Event");
+        host.model().changeEdl().remove(firstChange());
+    }
+    ASSERT_TRUE(host.undo());
+    ASSERT_TRUE(adapter().isPreviewActive());
+    host.preview(changes());
+
+    ASSERT_TRUE(host.undo());
+
+    EXPECT_FALSE(adapter().isPreviewActive());
+}
+
 TEST_P(HostPreviewTest, KeepsWhatItCanOfHowEverythingStood)
 {
     // From a preview before, which stood elsewhere.

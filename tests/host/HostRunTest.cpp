@@ -9,11 +9,14 @@
 #include "host/border/HostFailure.h"
 #include "host/project/Project.h"
 #include "host/track/TrackRole.h"
+#include "host/undo/RunNoteStep.h"
 #include "standin/project/AutomationPoint.h"
 #include "standin/project/Track.h"
 #include "standin/services/IdleManager.h"
+#include "tests/host/project/AlteredEdits.h"
 #include "tests/support/core/RecordingListener.h"
 #include "tests/support/host/AdaptedHost.h"
+#include "tests/support/host/UnmarkedPoint.h"
 #include "tests/support/host/WatchedProgress.h"
 #include "tests/support/standin/TestHost.h"
 #include "velmark/Attributes.h"
@@ -230,6 +233,43 @@ TEST_P(HostRunTest, IsNotedInTheModelAndItsUndoTakesTheNoteBack)
     EXPECT_FALSE(isDone());
     ASSERT_TRUE(host.redo());
     EXPECT_TRUE(isDone());
+}
+
+TEST_P(HostRunTest, ItsUndoTakesTheNoteBackAlsoWhereTheHostRefusesTheStepOfTheModel)
+{
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    int refused = 0;
+    edits->addsStep = [&](IEditStep* step) {
+        const bool isOfTheModel = dynamic_cast<DataModelEditStep*>(step) != nullptr;
+        refused += isOfTheModel ? 1 : 0;
+        return !isOfTheModel;
+    };
+    host.altered.replace(IEditService::iid, edits);
+    host.conform();
+    ASSERT_EQ(refused, 1);
+    ASSERT_EQ(host.undoNames().back(), u"Apply Cadrel");
+    ASSERT_TRUE(core::RunRecord::find(host.model()));
+
+    for (int round = 0; round < 2; ++round) {
+        ASSERT_TRUE(host.undo());
+        EXPECT_FALSE(core::RunRecord::find(host.model()));
+        EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+        ASSERT_TRUE(host.redo());
+        EXPECT_TRUE(core::RunRecord::find(host.model()));
+    }
+}
+
+TEST_P(HostRunTest, SaysThatItIsIncompleteWhereItsNoteCannotFollowTheUndoList)
+{
+    const auto edits = makeCounted<AlteredEdits>(host.context());
+    edits->addsStep = [](IEditStep* step) { return dynamic_cast<RunNoteStep*>(step) == nullptr; };
+    host.altered.replace(IEditService::iid, edits);
+
+    host.conform();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
+    EXPECT_EQ(heard.results, Results{Result::HostCallFailed});
+    EXPECT_FALSE(core::RunRecord::find(host.model()));
 }
 
 TEST_P(HostRunTest, IsNotedForWhatTheUserLetsChangeAndNotForTheBoundsOfItsRequest)
@@ -568,21 +608,45 @@ TEST(HostRunRange, LosesNothingWhereItsBoundsReachPastTheDayThatTimecodesName)
     }
 }
 
-TEST_P(HostRunTest, ReplacesNothingBetweenBoundsThatAreNoNumbersOrTheWrongWayRound)
+TEST_P(HostRunTest, IsRefusedWhereTheStoredBoundsAreNoNumbersOrTheWrongWayRound)
 {
-    constexpr double Infinity = std::numeric_limits<double>::infinity();
     constexpr double NoNumber = std::numeric_limits<double>::quiet_NaN();
     host.settings().setRestrictRange(true);
-    for (const auto& [before, after] : {std::pair(0.0, NoNumber), std::pair(NoNumber, 86400.0), std::pair(86400.0, 0.0),
-                                        std::pair(Infinity, Infinity), std::pair(-Infinity, -Infinity)}) {
+    for (const auto& [before, after] : {std::pair(0.0, NoNumber), std::pair(NoNumber, 86400.0),
+                                        std::pair(NoNumber, NoNumber), std::pair(86400.0, 0.0)}) {
         SCOPED_TRACE(std::to_string(before) + " to " + std::to_string(after));
         host.settings().set(&core::Settings::preserveMaterialBefore, before);
         host.settings().set(&core::Settings::preserveMaterialAfter, after);
+
+        EXPECT_EQ(host.adapter().startCadrel(), Result::CorruptData);
+        EXPECT_EQ(host.adapter().startCadrelWithin({host.onClock(0.0), host.onClock(20.0)}), Result::CorruptData);
+        host.idle();
+
+        EXPECT_EQ(host.undoNames(), entriesBefore);
+        EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+        EXPECT_FALSE(core::RunRecord::find(host.model()));
+    }
+    EXPECT_EQ(heard.results, Results{});
+
+    host.settings().setRestrictRange(false);
+    host.conform();
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostRunTest, ReplacesNothingBetweenBoundsPastAllTimesAndIsNotedForNone)
+{
+    constexpr double Infinity = std::numeric_limits<double>::infinity();
+    host.settings().setRestrictRange(true);
+    for (const double bound : {Infinity, -Infinity}) {
+        host.settings().set(&core::Settings::preserveMaterialBefore, bound);
+        host.settings().set(&core::Settings::preserveMaterialAfter, bound);
 
         host.conform();
 
         EXPECT_EQ(host.undoNames().back(), u"Apply Cadrel");
         EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+        const auto noted = core::RunRecord::find(host.model());
+        EXPECT_FALSE(noted && noted->haveCarriedOut(host.model().changeEdl(), true));
     }
 }
 
@@ -681,6 +745,51 @@ TEST_P(HostRunTest, MakesTheMemosAnewThatTheUserRemovesWhileItsAlertIsUp)
 
     EXPECT_EQ(heard.results, (Results{Result::Ok, Result::Ok}));
     EXPECT_TRUE(host.trackNamed(u"Memos"));
+}
+
+TEST_P(HostRunTest, MakesTheMemosAnewThatTheUserRemovesWhileItsProgressCloses)
+{
+    const auto progress = watch();
+    bool hasRemoved = false;
+    progress->whenCalled = [&] {
+        if (progress->calls.back() != "end" || std::exchange(hasRemoved, true))
+            return;
+        const AdaptedHost::Node memos = host.trackNamed(u"Memos");
+        host.edit(u"Remove", [&] { requireOk(host.transaction()->remove(memos->getParent(), memos.get())); });
+    };
+    host.conform();
+    ASSERT_TRUE(hasRemoved);
+    ASSERT_FALSE(host.trackNamed(u"Memos"));
+
+    host.conform();
+
+    EXPECT_EQ(heard.results, (Results{Result::Ok, Result::Ok}));
+    EXPECT_TRUE(host.trackNamed(u"Memos"));
+}
+
+TEST_P(HostRunTest, HoldsTheAutomationWhereTheHostsPointsTakeNoMarks)
+{
+    constexpr auto volume = standin::Envelope::Curve::Volume;
+    using Points = std::vector<std::pair<double, float>>;
+    for (const auto& [time, value] : {std::pair(2.0, 0.5F), std::pair(8.0, 0.5F), std::pair(8.0, 1.0F)})
+        host.addPoint(track, volume, host.inHost(time), value);
+    const Entries before = host.undoNames();
+    // From 10 s to 12 s there is nothing, and what the curve has come to at 10 s is held.
+    host.model().changeEdl().clear();
+    host.carryOver("01:00:00:00", "01:00:05:00", "01:00:05:00", "01:00:10:00");
+    host.carryOver("01:00:10:00", "01:00:20:00", "01:00:12:00", "01:00:22:00");
+    host.altered.makeInstead(ClassId::AutomationPoint, [] { return makeCounted<UnmarkedPoint>(); });
+
+    host.conform();
+
+    EXPECT_EQ(heard.results, Results{Result::Ok});
+    EXPECT_EQ(host.undoNames().size(), before.size() + 1);
+    Points found;
+    for (const AdaptedHost::Node& child : standin::tests::childrenOf(*host.curveOf(track, volume)))
+        found.emplace_back(child->getStart(nullptr) - host.inHost(0.0), query<IAutomationPoint>(child)->getValue());
+    ASSERT_GE(found.size(), 3U);
+    EXPECT_EQ(found[found.size() - 2], (std::pair{12.0, 0.5F}));
+    EXPECT_EQ(found.back(), (std::pair{12.0, 1.0F}));
 }
 
 TEST_P(HostRunTest, LeavesOutWhatHasNoTimecodes)

@@ -121,6 +121,23 @@ TEST(Application, AFileWhoseNameIsNoTextIsNeitherOpenedNorSaved)
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"a.stage", "caf\xe9.stage"}));
 }
 
+TEST(Application, OpensAContentThatIsNotThatOfTheFile)
+{
+    TestHost host;
+    const TempFolder folder;
+    host.addTrack(TypeWord::Audio, u"DX 1");
+    const std::string written = host.application.saveProject(host.project, folder / "a.stage");
+    EXPECT_EQ(written, contentOf(folder / "a.stage"));
+
+    Project& opened = host.application.openProject(folder / "none.stage", written);
+
+    EXPECT_EQ(opened.path(), (folder / "none.stage").u16string());
+    EXPECT_EQ(ProjectFile::toText(opened), written);
+    EXPECT_EQ(folder.names(), std::vector<std::string>{"a.stage"});
+    EXPECT_THROW(host.application.openProject(folder / "none.stage", "{"), ProjectFileError);
+    EXPECT_EQ(service<IProjectManager>(host.context())->projectCount(), 2);
+}
+
 TEST(Application, WhatIsOpenedWithinATransactionIsNoEdit)
 {
     TestHost host;

@@ -30,7 +30,7 @@ ChangeNotes::ChangeNotes(const EventList& oldEvents, const EventList& newEvents,
     : m_framerate(rules.framerate), m_oldCut(oldEvents, rules, m_numbers), m_newCut(newEvents, rules, m_numbers)
 {
     const StepChanges changes(m_oldCut, m_newCut);
-    StepList list = makeSteps(m_oldCut, m_newCut, findKeptStretches(m_oldCut, m_newCut));
+    StepList list = makeSteps(m_oldCut, m_newCut, findKeptStretches(m_oldCut, m_newCut), m_framerate);
     for (std::size_t reel = 0; reel < list.reels.size(); ++reel) {
         joinTrims(list.rows[reel], simplify, changes);
         ReelNotes notes;
@@ -55,6 +55,8 @@ void ChangeNotes::number()
             if (const NoteStep* const step = entry.step()) {
                 entry.number = ++m_totals.steps;
                 entry.lengthChange = step->lengthChange();
+                if (step->action == StepAction::MoveReel && step->place.reel != reel)
+                    m_reels[step->place.reel].movedBy = step->changes.front().isOutOfTheWay ? 0 : entry.number;
                 if (step->action == StepAction::Move && step->from.reel != step->place.reel) {
                     const std::size_t other = step->from.reel == reel ? step->place.reel : step->from.reel;
                     entry.lengthChange = step->place.reel == reel ? step->moved : -step->moved;
@@ -90,7 +92,7 @@ void ChangeNotes::count()
 
 bool ReelNotes::isUnchanged() const
 {
-    return before == after &&
+    return before == after && movedBy == 0 &&
            std::all_of(entries.begin(), entries.end(), [](const NoteEntry& entry) { return entry.kept() != nullptr; });
 }
 
@@ -119,15 +121,6 @@ std::size_t ChangeNotes::joinedSteps() const
             joined += entry.step() != nullptr && entry.step()->joined > 1 ? entry.step()->joined : 0;
     }
     return joined;
-}
-
-std::int32_t ChangeNotes::timecodeOf(const WorkPlace& place, std::size_t reel) const
-{
-    const ReelChange& pair = m_reels[place.reel].pair;
-    const bool hasItsNewStart = place.reel <= reel || !pair.oldReel;
-    return (hasItsNewStart && pair.newReel ? m_newCut.reels()[*pair.newReel] : m_oldCut.reels()[*pair.oldReel])
-               .timecodeStart +
-           place.frame;
 }
 
 std::int32_t ChangeNotes::oldTimecode(std::int32_t frame) const

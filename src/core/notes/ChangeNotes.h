@@ -44,6 +44,8 @@ struct ReelNotes {
     ReelChange pair;
     std::int32_t before = 0;
     std::int32_t after = 0;
+    std::size_t movedBy =
+        0; ///< the step of an earlier reel that has moved all of this one to its new place; 0 for none
     std::vector<NoteEntry> entries;
 
     /// Whether all of its picture stands where it stood.
@@ -76,10 +78,7 @@ public:
     /// How many steps were joined into others.
     std::size_t joinedSteps() const;
 
-    /// The frame count of the timecode of a place in the programme as it is at a row of `reel`, after the step that moves that
-    /// reel: the reels up to this one begin where they do in the new cut by then, and the others where they did in the old one.
-    std::int32_t timecodeOf(const WorkPlace& place, std::size_t reel) const;
-    /// Of a frame of the old or the new programme.
+    /// The frame count of the timecode of a frame of the old or the new programme.
     std::int32_t oldTimecode(std::int32_t frame) const;
     std::int32_t newTimecode(std::int32_t frame) const;
     /// Where the source of inserted, replaced or retimed picture begins; of a part of a shot, where that of the part does. Of

@@ -57,6 +57,7 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Eve
       m_name(numbers.numberOf(materialText("name", {plainNameOf(events.at(index), rules)})))
 {
     const EventBase& event = events.at(index);
+    m_length = event.dstOut().toFrameCount(rules.framerate) - event.dstIn().toFrameCount(rules.framerate);
     const std::string& name = nameBy(rules.matchBy, event);
     const std::string key = keyOf(event, rules);
     const std::int32_t version = numbers.numberOf(materialText("version", {name}));
@@ -69,11 +70,12 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Eve
         return;
     }
     const double source = firstSourceFrame(event, rules.framerate);
-    const double speed = event.motionSpeed();
-    if (isFreeze(event, rules.framerate))
+    const bool isStill = isFreeze(event, rules.framerate);
+    const double speed = isStill || event.isNormalSpeed() ? 1.0 : event.motionSpeed();
+    if (isStill)
         m_body = {numbers.numberOf(materialText("freeze", {key, event.srcIn().toString()})), version, 0.0, 1.0};
     else
-        m_body = {numbers.numberOf(materialText("clip", {key})), version, source, event.isNormalSpeed() ? 1.0 : speed};
+        m_body = {numbers.numberOf(materialText("clip", {key})), version, source, speed};
     if (!event.isTransition() || event.transitionDuration() <= 0)
         return;
 
@@ -83,12 +85,12 @@ EventPicture::EventPicture(const EventList& events, std::size_t index, const Eve
     const std::string outgoingName = outgoing == nullptr ? std::string() : nameBy(rules.matchBy, *outgoing);
     const std::string text =
         materialText("transition", {std::to_string(event.transitionType()), std::to_string(event.transitionDuration()),
-                                    key, event.firstSource().toString(), std::to_string(std::lround(speed * 100)),
+                                    key, event.firstSource().toString(), isStill ? "freeze" : "",
                                     outgoing == nullptr ? std::string() : keyOf(*outgoing, rules),
                                     outgoing == nullptr ? std::string() : outgoing->lastSource().toString()});
-    m_transition = {numbers.numberOf(text), numbers.numberOf(materialText("version", {name, outgoingName})), 0.0, 1.0};
-    m_transitionLength = std::min(event.transitionDuration(), event.dstOut().toFrameCount(rules.framerate) -
-                                                                  event.dstIn().toFrameCount(rules.framerate));
+    m_transition = {numbers.numberOf(text), numbers.numberOf(materialText("version", {name, outgoingName})), 0.0,
+                    speed};
+    m_transitionLength = std::min(event.transitionDuration(), m_length);
 }
 
 ShownRun EventPicture::runFrom(std::int32_t from) const
@@ -103,7 +105,17 @@ ShownRun EventPicture::runFrom(std::int32_t from) const
             .source = material.source + from * material.sourceStep,
             .sourceStep = material.sourceStep,
             .event = m_event,
-            .isTransition = isTransition};
+            .isTransition = isTransition,
+            .eventFrame = from,
+            .eventLength = m_length};
+}
+
+bool canBeSameSpeed(double a, std::int32_t lengthOfA, double b, std::int32_t lengthOfB)
+{
+    constexpr double OneFrame = 1.0 - 1e-6; // a speed is no whole number of frames
+    const bool haveSameDirection = std::signbit(a) == std::signbit(b);
+    return EventBase::areSameSpeed(a, b) ||
+           (haveSameDirection && std::abs(a - b) * std::min(lengthOfA, lengthOfB) < OneFrame);
 }
 
 bool isFreeze(const EventBase& event, const Framerate& framerate)

@@ -29,11 +29,16 @@ private:
     };
 
     std::int32_t m_event;
-    std::int32_t m_name; ///< without its version
+    std::int32_t m_name;       ///< without its version
+    std::int32_t m_length = 0; ///< of the event in frames
     Material m_body;
     std::optional<Material> m_transition;
     std::int32_t m_transitionLength = 0;
 };
+
+/// Whether the speeds of two events may be one, since the timecodes that they come from are rounded to whole frames. The
+/// lengths are those of the events in frames; the longer one tells the speed more exactly.
+bool canBeSameSpeed(double a, std::int32_t lengthOfA, double b, std::int32_t lengthOfB);
 
 /// Whether an event shows a single frame of its source in all of its frames.
 bool isFreeze(const EventBase& event, const Framerate& framerate);

@@ -4,7 +4,6 @@
 
 #include "core/notes/KeptStretches.h"
 
-#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <optional>
@@ -54,12 +53,16 @@ struct PictureChange {
     bool isPart = false;                ///< of a lift: the rest of the shot stays somewhere
     bool hasOldTransition = false;      ///< the dissolve or wipe of the old shot goes with it
     bool hasNewTransition = false;      ///< the new shot brings its dissolve or wipe
+    bool isOutOfTheWay = false;         ///< of a reel: it goes to a free place, from where it is moved on
 };
 
 /// Where frames are in the programme as it is when all steps before have been carried out.
 struct WorkPlace {
-    std::size_t reel = 0;   ///< place in the list of reels
-    std::int32_t frame = 0; ///< from the first frame of the reel
+    std::size_t reel = 0;       ///< place in the list of reels
+    std::int32_t frame = 0;     ///< from the first frame of the reel
+    std::int32_t reelStart = 0; ///< the frame count of the timecode of that first frame then
+
+    std::int32_t timecode() const { return reelStart + frame; }
 
     bool operator==(const WorkPlace&) const = default;
 };
@@ -68,11 +71,12 @@ enum class StepAction {
     Replace,  ///< delete `removed` frames at `place`, then insert `inserted` there; one of them may be empty
     Move,     ///< take `moved` frames out at `from` and insert them at `place`, which is counted without them
     Relabel,  ///< the frames at `place` stay and are replaced by `inserted`, which show another version of them
-    MoveReel, ///< all of the reel of `place` is moved to the timecode at which it begins in the new cut
+    MoveReel, ///< all of the reel of `place` is moved from the timecode of `from` to that of `place`
 };
 
 /// One step of the way from the old cut to the new one. Steps are in the order of the new programme. Before the place of
-/// a step that replaces, all is as it is in the new cut. A reel that begins elsewhere is moved by its first step.
+/// a step that replaces, all is as it is in the new cut. A reel that begins elsewhere is moved by its first step, or by one
+/// of an earlier reel, in whose way it would be.
 struct NoteStep {
     StepAction action = StepAction::Replace;
     WorkPlace place;
@@ -85,8 +89,6 @@ struct NoteStep {
     std::vector<PictureChange> changes; ///< at least one
     std::size_t joined = 1;             ///< of so many steps this one is made, new versions not counted
 
-    /// The reel of whose rows it is one: of a move between reels that which comes first.
-    std::size_t reel() const { return action == StepAction::Move ? std::min(from.reel, place.reel) : place.reel; }
     /// What the reel of `place` wins or loses where it is no move within the reel.
     std::int32_t lengthChange() const { return action == StepAction::Replace ? inserted.length - removed : 0; }
 };

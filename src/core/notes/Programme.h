@@ -31,6 +31,8 @@ struct ShownRun {
     double sourceStep;
     std::int32_t event; ///< place in the list, or NoEvent for a gap
     bool isTransition;
+    std::int32_t eventFrame = 0;  ///< which frame of the event the first one is
+    std::int32_t eventLength = 0; ///< frames of the whole event
 
     std::int32_t end() const { return start + length; }
     bool isGap() const { return event == NoEvent; }

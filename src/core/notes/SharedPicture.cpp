@@ -2,7 +2,7 @@
 
 #include "core/notes/SharedPicture.h"
 
-#include "core/edl/EventBase.h"
+#include "core/notes/EventPicture.h"
 
 #include <algorithm>
 #include <bit>
@@ -20,12 +20,30 @@ constexpr std::size_t MostFound = 16;
 
 constexpr std::size_t FramesOfAWord = 64;
 
+/// How many frames later in the old run the picture of a frame of the new run stands. Of a slow shot the source is rounded
+/// more than the programme, so that the starts or the ends of the events decide, whichever fit better.
+std::int64_t shiftBetween(const ShownRun& oldRun, const ShownRun& newRun)
+{
+    if (oldRun.sourceStep == newRun.sourceStep)
+        return std::llround((newRun.source - oldRun.source) / oldRun.sourceStep);
+    const double speed = (oldRun.eventLength < newRun.eventLength ? newRun : oldRun).sourceStep;
+    const auto startOf = [](const ShownRun& run) { return run.source - run.eventFrame * run.sourceStep; };
+    const auto endOf = [&](const ShownRun& run) { return startOf(run) + run.eventLength * run.sourceStep; };
+    const double atStart = startOf(newRun) - startOf(oldRun);
+    const double atEnd = endOf(newRun) - endOf(oldRun);
+    constexpr double SameFrame = 1e-6;
+    const std::int64_t ofEvents = std::abs(atEnd) < std::abs(atStart) - SameFrame
+                                      ? oldRun.eventLength - newRun.eventLength + std::llround(atEnd / speed)
+                                      : std::llround(atStart / speed);
+    return ofEvents + newRun.eventFrame - oldRun.eventFrame;
+}
+
 std::optional<SharedPicture> share(const ShownRun& oldRun, std::size_t oldIndex, const ShownRun& newRun,
                                    std::size_t newIndex)
 {
-    if (!EventBase::areSameSpeed(oldRun.sourceStep, newRun.sourceStep))
+    if (!canBeSameSpeed(oldRun.sourceStep, oldRun.eventLength, newRun.sourceStep, newRun.eventLength))
         return std::nullopt;
-    const auto shift = static_cast<std::int64_t>(std::llround((newRun.source - oldRun.source) / oldRun.sourceStep));
+    const std::int64_t shift = shiftBetween(oldRun, newRun);
     const std::int64_t first = std::max<std::int64_t>(0, -shift);
     const std::int64_t end = std::min<std::int64_t>(newRun.length, oldRun.length - shift);
     if (first >= end)

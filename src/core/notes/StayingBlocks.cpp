@@ -150,8 +150,12 @@ std::vector<ReelChange> pairReels(const Programme& oldCut, const Programme& newC
     pairByStart(pairs, isTaken, oldCut, newCut);
     pairBetweenNeighbours(pairs, isTaken);
     for (std::size_t oldReel = 0; oldReel < isTaken.size(); ++oldReel) {
-        if (!isTaken[oldReel])
-            pairs.push_back({oldReel, std::nullopt});
+        if (isTaken[oldReel])
+            continue;
+        const auto before = std::find_if(pairs.begin(), pairs.end(), [oldReel](const ReelChange& pair) {
+            return oldReel > 0 && pair.oldReel == oldReel - 1;
+        });
+        pairs.insert(before == pairs.end() ? pairs.begin() : before + 1, {oldReel, std::nullopt});
     }
     return pairs;
 }
@@ -160,9 +164,14 @@ std::vector<KeptBlock> findBlocks(const Programme& oldCut, const Programme& newC
                                   const std::vector<KeptStretch>& kept, const std::vector<ReelChange>& reels)
 {
     std::vector<KeptBlock> blocks = joinToBlocks(oldCut, newCut, kept);
+    std::vector<std::optional<std::size_t>> oldReels(newCut.reels().size());
+    for (const ReelChange& pair : reels) {
+        if (pair.newReel)
+            oldReels[*pair.newReel] = pair.oldReel;
+    }
     std::vector<std::vector<std::size_t>> candidates(newCut.reels().size());
     for (std::size_t block = 0; block < blocks.size(); ++block) {
-        if (reels[blocks[block].newReel].oldReel == blocks[block].oldReel)
+        if (oldReels[blocks[block].newReel] == blocks[block].oldReel)
             candidates[blocks[block].newReel].push_back(block);
     }
     for (const auto& ofReel : candidates)

@@ -22,7 +22,8 @@ struct KeptBlock {
 };
 
 /// Brings together each new reel and the old one whose picture it has most of; of reels without any common picture those
-/// that begin at the same timecode, and as many as stand between the same other reels. The new reels come first, in order, then old ones that are gone.
+/// that begin at the same timecode, and as many as stand between the same other reels. They are in the order of
+/// the new cut; a reel that is gone comes after the one that was before it.
 std::vector<ReelChange> pairReels(const Programme& oldCut, const Programme& newCut,
                                   const std::vector<KeptStretch>& kept);
 

@@ -4,9 +4,11 @@
 
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
+#include "core/notes/EventPicture.h"
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdlib>
 #include <initializer_list>
 #include <utility>
 
@@ -19,8 +21,9 @@ struct ShotPiece {
     std::int32_t event = ShownRun::NoEvent;
     FrameSpan frames;
     bool hasTransition = false;
-    std::int32_t name = 0; ///< that of its run
-    bool isTold = false;   ///< as a part of another change
+    std::int32_t name = 0;        ///< that of its run
+    std::int32_t eventLength = 0; ///< likewise
+    bool isTold = false;          ///< as a part of another change
 };
 
 std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameSpan& frames)
@@ -38,7 +41,7 @@ std::vector<ShotPiece> piecesOf(const Programme& programme, const FrameSpan& fra
             pieces.back().frames.length += length;
             pieces.back().hasTransition |= run.isTransition;
         } else {
-            pieces.push_back({run.event, {start, length}, run.isTransition, run.name});
+            pieces.push_back({run.event, {start, length}, run.isTransition, run.name, run.eventLength});
         }
     }
     return pieces;
@@ -228,28 +231,47 @@ private:
     /// The shots of a transition are taken to meet in the middle of it.
     void moveCutsToCentres(const PictureChange& transition)
     {
-        const auto halfOf = [](bool hasTransition, const EventBase* shot) {
-            return hasTransition && shot != nullptr ? shot->transitionDuration() / 2 : 0;
-        };
+        const std::int32_t oldDuration = m_oldTransition ? durationOf(transition.oldShot) : 0;
+        const std::int32_t newDuration = m_newTransition ? durationOf(transition.newShot) : 0;
         if (m_oldTransition && m_around.afterInOld && (m_old.size() > 1 || m_around.beforeInOld)) {
-            const std::int32_t half = halfOf(true, transition.oldShot);
+            const std::int32_t half = oldDuration / 2;
             (endsAlike() ? m_head : m_otherHead).fromTransition += half;
             if (m_around.beforeInOld && goesOutOfShotBefore(m_old))
                 (beginsAlike() ? m_tail : m_otherTail).fromTransition -= half;
+            else
+                lengthenOutgoing(m_old, half);
         }
         if (m_newTransition && m_around.afterInNew && (m_new.size() > 1 || m_around.beforeInNew)) {
-            const std::int32_t half = halfOf(true, transition.newShot);
+            const std::int32_t half = newDuration / 2;
             m_head.fromTransition -= half;
             if (m_around.beforeInNew && goesOutOfShotBefore(m_new))
                 m_tail.fromTransition += half;
+            else
+                lengthenOutgoing(m_new, half);
         }
         const bool isOneCut = !m_oldTransition || (beginsAlike() && endsAlike());
-        if (isOneCut && !isSameTransition(transition) && m_tail.change() == -m_head.change()) {
+        // The cut of the one cut lies within the transition of the other.
+        const bool isThere = std::abs(m_tail.change()) <= (std::max(oldDuration, newDuration) + 1) / 2;
+        if (isOneCut && isThere && !isSameTransition(transition) && m_tail.change() == -m_head.change()) {
             m_tail = {};
             m_head = {};
             return;
         }
         nameTrims();
+    }
+
+    static std::int32_t durationOf(const EventBase* shot) { return shot != nullptr ? shot->transitionDuration() : 0; }
+
+    /// Of a shot that comes or goes and is seen in the first half of the transition after it.
+    static void lengthenOutgoing(std::vector<ShotPiece>& pieces, std::int32_t half)
+    {
+        if (pieces.size() < 2)
+            return;
+        const ShotPiece& incoming = pieces.back();
+        ShotPiece& outgoing = pieces[pieces.size() - 2];
+        if (incoming.isTold && incoming.hasTransition && half <= incoming.frames.length && !outgoing.isTold &&
+            outgoing.event != ShownRun::NoEvent && outgoing.frames.end() == incoming.frames.start)
+            outgoing.frames.length += half;
     }
 
     static bool isSameTransition(const PictureChange& change)
@@ -322,7 +344,8 @@ private:
         const EventBase* const newShot = shotOf(m_newCut, newPiece.event);
         return oldShot != nullptr && newShot != nullptr && oldShot->isValid() && newShot->isValid() &&
                oldPiece.name == newPiece.name &&
-               !EventBase::areSameSpeed(oldShot->signedSpeed(), newShot->signedSpeed()) &&
+               !canBeSameSpeed(oldShot->signedSpeed(), oldPiece.eventLength, newShot->signedSpeed(),
+                               newPiece.eventLength) &&
                (oldShot->srcIn() < newShot->srcOut() || oldShot->srcIn() == newShot->srcIn()) &&
                (newShot->srcIn() < oldShot->srcOut() || oldShot->srcIn() == newShot->srcIn());
     }

@@ -3,6 +3,7 @@
 #include "core/notes/StepMaker.h"
 
 #include "core/notes/PrefixTrees.h"
+#include "core/notes/ReelMoves.h"
 #include "core/notes/StayingBlocks.h"
 #include "core/notes/StepChanges.h"
 
@@ -55,8 +56,6 @@ public:
         m_frames = &frames;
         for (std::size_t slot = 0; slot < m_slots.size(); ++slot)
             frames.set(slot, framesAtFirst(m_slots[slot]));
-        for (std::size_t reel = 0; reel < m_list.reels.size(); ++reel)
-            moveReel(reel);
         for (std::size_t slot = 0; slot < m_slots.size(); ++slot)
             carryOut(slot);
         m_frames = nullptr;
@@ -280,29 +279,6 @@ private:
         }
     }
 
-    /// Where it begins at another timecode now.
-    void moveReel(std::size_t reel)
-    {
-        const ReelChange& pair = m_list.reels[reel];
-        if (!pair.oldReel || !pair.newReel)
-            return;
-        const Reel& was = m_oldCut.reels()[*pair.oldReel];
-        const Reel& is = m_newCut.reels()[*pair.newReel];
-        if (was.timecodeStart == is.timecodeStart)
-            return;
-        PictureChange change;
-        change.kind = ChangeKind::ReelMoved;
-        change.frames = is.timecodeStart - was.timecodeStart;
-        change.inOld = {was.start, was.length};
-        change.inNew = {is.start, is.length};
-        NoteStep step;
-        step.action = StepAction::MoveReel;
-        step.place = {reel, 0};
-        step.from = step.place;
-        step.changes = {change};
-        m_list.rows[reel].emplace_back(std::move(step));
-    }
-
     NoteStep move(std::size_t block)
     {
         const KeptBlock& moved = m_blocks[block];
@@ -439,9 +415,12 @@ private:
 
 } // namespace
 
-StepList makeSteps(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept)
+StepList makeSteps(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept,
+                   const Framerate& framerate)
 {
-    return StepMaker(oldCut, newCut, kept).make();
+    StepList list = StepMaker(oldCut, newCut, kept).make();
+    moveReels(list, oldCut, newCut, framerate);
+    return list;
 }
 
 } // namespace cadrel::core

@@ -18,9 +18,10 @@ struct StepList {
 };
 
 /// Makes as few steps as possible that keep all picture of `kept`: between two kept stretches one, whatever is deleted and
-/// inserted there, and one for each block that is moved. What is deleted within a moved block moves along first. A reel that begins at another
-/// timecode is moved there by its first step.
-StepList makeSteps(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept);
+/// inserted there, and one for each block that is moved. What is deleted within a moved block moves along first. Reels are moved
+/// as a whole where they begin at another timecode, or are in each other's way.
+StepList makeSteps(const Programme& oldCut, const Programme& newCut, const std::vector<KeptStretch>& kept,
+                   const Framerate& framerate);
 
 /// Joins steps that only trim and whose trims cancel out within `frames` frames into one step without a change of length,
 /// which replaces what lies between them, too, and says so. A `frames` of 0 joins none.

@@ -12,7 +12,6 @@
 #include "host/track/Instant.h"
 #include "host/track/Track.h"
 #include "velmark/Attributes.h"
-#include "velmark/Automation.h"
 #include "velmark/Project.h"
 
 #include <algorithm>
@@ -35,7 +34,8 @@ constexpr double Day = 86400.0;
 
 /// The second number of what is stored. What is stored without it has one number or an even count.
 constexpr double NamesLayout = 1.0;
-constexpr double ContentsLayout = 2.0;
+constexpr double CurvesLayout = 2.0;
+constexpr double PointsLayout = 3.0;
 constexpr std::size_t NamesHeadSize = 5;
 constexpr std::size_t HeadSize = 7;
 constexpr std::size_t EventSize = 4;
@@ -64,6 +64,12 @@ double checksumOf(std::span<const double> numbers)
     return static_cast<double>(bytes.crc32() >> 3);
 }
 
+Numbers joined(Numbers numbers, const Numbers& others)
+{
+    numbers.insert(numbers.end(), others.begin(), others.end());
+    return numbers;
+}
+
 std::uint32_t flagsOf(const core::Framerate& framerate)
 {
     using Flag = FrameRateInfo::Flag;
@@ -85,13 +91,31 @@ bool isSoundHead(const PreviewRecord::Head& head)
     return head.start > 0.0 && head.end.value_or(head.start) <= 2.0 * (head.start + Day);
 }
 
+/// As the curves of an earlier project tell it, and where they don't. Nothing where they are damaged.
+std::optional<WrittenAutomation> automationOn(std::optional<Numbers> curves, const PreviewRecord::Head& head)
+{
+    if (curves) {
+        if (curves->empty())
+            return std::nullopt;
+        const double checksum = std::exchange(curves->front(), head.start);
+        if (checksum != checksumOf(*curves))
+            return std::nullopt;
+        curves->erase(curves->begin());
+    }
+    return WrittenAutomation::upTo(head.end.value_or(head.start), std::move(curves));
+}
+
 } // namespace
 
 struct PreviewRecord::StoredHead {
     Head head;
-    double checksum; ///< of the events
+    double checksum; ///< of the events, and of the points where they are known
+    bool knowsPoints;
 
-    static bool isOne(const Numbers& numbers) { return numbers.size() == HeadSize && numbers[1] == ContentsLayout; }
+    static bool isOne(const Numbers& numbers)
+    {
+        return numbers.size() == HeadSize && (numbers[1] == PointsLayout || numbers[1] == CurvesLayout);
+    }
     static std::optional<StoredHead> of(const Numbers& numbers)
     {
         if (!isOne(numbers) || numbers.back() != checksumOf(std::span(numbers).first(HeadSize - 1)))
@@ -99,7 +123,9 @@ struct PreviewRecord::StoredHead {
         const double start = numbers[0];
         const double end = numbers[4];
         const Head head{start, end < start ? std::nullopt : std::optional(end), framerateFrom(numbers[2], numbers[3])};
-        return isSoundHead(head) ? std::optional(StoredHead{head, numbers[5]}) : std::nullopt;
+        if (!isSoundHead(head))
+            return std::nullopt;
+        return StoredHead{head, numbers[5], numbers[1] == PointsLayout};
     }
 };
 
@@ -112,18 +138,14 @@ PreviewRecord PreviewRecord::ofContent(const Track& track, double start, const c
         if (!isBefore(child->getStart(nullptr), start))
             record.add(record.numbersOf(*child));
     }
-    record.m_curves.emplace();
     for (const Node& curve : curvesOf(*track.node())) {
-        std::optional<double> last;
         for (const Node& point : childrenOf(*curve)) {
             const double time = point->getStart(curve.get());
-            if (!isBefore(time, start))
-                last = std::max(last.value_or(time), time);
+            if (isBefore(time, start))
+                continue;
+            record.reachTo(time);
+            record.m_automation.add(*curve, *point);
         }
-        if (!last)
-            continue;
-        record.reachTo(*last);
-        record.m_curves->push_back(required(query<IEnvelopeTrack>(curve))->curveNumber());
     }
     return record;
 }
@@ -134,22 +156,10 @@ std::optional<PreviewRecord> PreviewRecord::keptBy(const Track& track)
     if (!numbers || numbers->empty())
         return std::nullopt;
     std::optional<PreviewRecord> record;
-    if (!StoredHead::isOne(*numbers)) {
+    if (const auto stored = StoredHead::of(*numbers))
+        record = ofContents(*stored, track);
+    else if (!StoredHead::isOne(*numbers))
         record = numbers->size() == 1 || numbers->size() % 2 == 0 ? ofPlaces(*numbers) : ofNames(*numbers);
-    } else if (const auto stored = StoredHead::of(*numbers)) {
-        const Numbers events = numbersOn(track, AttributeKey::PreviewEvents).value_or(Numbers());
-        if (events.size() % EventSize != 0 || stored->checksum != checksumOf(events))
-            return std::nullopt;
-        record = PreviewRecord(stored->head, Compared::Contents);
-        record->add(events, 0);
-        Numbers curves = readNumbers(*nodeOf(track), AttributeKey::PreviewCurves).value_or(Numbers());
-        if (!curves.empty()) {
-            const double checksum = curves.front();
-            curves.erase(curves.begin());
-            if (checksum == record->checksumOfCurves(curves))
-                record->m_curves = std::move(curves);
-        }
-    }
     return record && record->isSound() ? record : std::nullopt;
 }
 
@@ -174,6 +184,7 @@ std::optional<PreviewRecord> PreviewRecord::ofPlaces(const Numbers& numbers)
     for (std::size_t index = 2; index < numbers.size(); index += 2)
         record.add(Event{numbers[index], numbers[index + 1], 0.0, 0.0});
     record.reachTo(numbers[1]);
+    record.m_automation = WrittenAutomation::upTo(*record.end(), std::nullopt);
     return record;
 }
 
@@ -188,6 +199,25 @@ std::optional<PreviewRecord> PreviewRecord::ofNames(const Numbers& numbers)
         return numbers.size() == NamesHeadSize ? std::optional(record) : std::nullopt;
     record.add(numbers, NamesHeadSize);
     record.reachTo(end);
+    record.m_automation = WrittenAutomation::upTo(*record.end(), std::nullopt);
+    return record;
+}
+
+std::optional<PreviewRecord> PreviewRecord::ofContents(const StoredHead& head, const Track& track)
+{
+    const Numbers events = numbersOn(track, AttributeKey::PreviewEvents).value_or(Numbers());
+    const std::optional<Numbers> curves = readNumbers(*nodeOf(track), AttributeKey::PreviewCurves);
+    if (!curves && nodeOf(track)->hasAttribute(AttributeKey::PreviewCurves) == ResultOk)
+        return std::nullopt;
+    const Numbers points = head.knowsPoints ? curves.value_or(Numbers()) : Numbers();
+    if (events.size() % EventSize != 0 || head.checksum != checksumOf(joined(events, points)))
+        return std::nullopt;
+    auto automation = head.knowsPoints ? WrittenAutomation::ofNumbers(points) : automationOn(curves, head.head);
+    if (!automation)
+        return std::nullopt;
+    PreviewRecord record(head.head, Compared::Contents);
+    record.add(events, 0);
+    record.m_automation = *std::move(automation);
     return record;
 }
 
@@ -206,24 +236,21 @@ void PreviewRecord::dropFrom(const Track& track)
 void PreviewRecord::keepOn(IHostContext* context, const Track& track) const
 {
     const Counted<IProjectNode> node = nodeOf(track);
-    if (m_numbers.empty())
-        removeNumbers(*node, AttributeKey::PreviewEvents);
-    else
-        writeNumbers(context, *node, AttributeKey::PreviewEvents, m_numbers);
-    if (m_curves) {
-        Numbers curves{checksumOfCurves(*m_curves)};
-        curves.insert(curves.end(), m_curves->begin(), m_curves->end());
-        writeNumbers(context, *node, AttributeKey::PreviewCurves, curves);
-    } else {
-        removeNumbers(*node, AttributeKey::PreviewCurves);
-    }
+    const auto keep = [&](const char* key, const Numbers& numbers) {
+        if (numbers.empty())
+            removeNumbers(*node, key);
+        else
+            writeNumbers(context, *node, key, numbers);
+    };
+    keep(AttributeKey::PreviewEvents, m_numbers);
+    keep(AttributeKey::PreviewCurves, m_automation.numbers());
     const core::Framerate framerate = m_head.framerate.value_or(core::Framerate());
     Numbers head{start(),
-                 ContentsLayout,
+                 PointsLayout,
                  framerate.rate,
                  static_cast<double>(flagsOf(framerate)),
                  end().value_or(start() - 1.0),
-                 checksumOf(m_numbers)};
+                 checksumOf(joined(m_numbers, m_automation.numbers()))};
     head.push_back(checksumOf(head));
     writeNumbers(context, *node, AttributeKey::Preview, head);
 }
@@ -268,18 +295,6 @@ void PreviewRecord::add(const Numbers& events, std::size_t from)
 void PreviewRecord::reachTo(double time)
 {
     m_head.end = std::max(end().value_or(time), time);
-}
-
-bool PreviewRecord::hasWrittenOn(std::int32_t curve) const
-{
-    return !m_curves || std::ranges::find(*m_curves, static_cast<double>(curve)) != m_curves->end();
-}
-
-double PreviewRecord::checksumOfCurves(const Numbers& curves) const
-{
-    Numbers all{start()};
-    all.insert(all.end(), curves.begin(), curves.end());
-    return checksumOf(all);
 }
 
 bool PreviewRecord::isSound() const

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/time/Framerate.h"
+#include "host/project/WrittenAutomation.h"
 #include "velmark/Counted.h"
 #include "velmark/ProjectNode.h"
 
@@ -27,20 +28,19 @@ class Track;
 ///
 /// Times are seconds from the time origin, and stay true when that moves. The numbers of the first attribute are:
 ///
-///     start, 2, frame rate, its flags, end,     the end lies before the start where nothing is written
-///     checksum of the second one, checksum of these six
+///     start, 3, frame rate, its flags, end,     the end lies before the start where nothing is written
+///     checksum of the other two, checksum of these six
 ///
-/// and those of the second one, which isn't there where there are none:
+/// and those of the other two, which aren't there where there are none:
 ///
 ///     start, end, source offset, content        of each event, the content as contentPrintOf gives it
+///     number of the curve, time, value          of each automation point
 ///
-/// The third one has the curves with automation:
-///
-///     checksum of the start and of what follows, number of each curve
-///
-/// In earlier projects there is no third one, or one attribute has it all: after the start the number 1, rate, flags and end, followed by the events
-/// with their names alone, as namePrintOf gives them; or only the start, or the start and the end, followed by the start and
-/// end of each event.
+/// In earlier projects the first one has 2 after the start, and a checksum of the second one alone. The third one has a checksum
+/// of the start and of what follows, and then the numbers of the curves on which something is written; or it isn't there, and
+/// nobody knows which they are. Nor does anybody where one attribute has it all: after the start the number 1, rate, flags and
+/// end, followed by the events with their names alone, as namePrintOf gives them; or only the start, or the start and the end,
+/// followed by the start and end of each event.
 class PreviewRecord {
 public:
     using Node = Velmark::Counted<Velmark::IProjectNode>;
@@ -63,13 +63,13 @@ public:
     static bool isKeptBy(const Track& track);
     /// Throws Result::HostCallFailed when the host refuses; so does keepOn.
     static void dropFrom(const Track& track);
+    /// For one that ofContent has made.
     void keepOn(Velmark::IHostContext* context, const Track& track) const;
 
     double start() const { return m_head.start; }
     std::optional<double> end() const { return m_head.end; }
     std::optional<core::Framerate> framerate() const { return m_head.framerate; }
-    /// Whether automation was written on a curve. Where that isn't known, each may have some.
-    bool hasWrittenOn(std::int32_t curve) const;
+    const WrittenAutomation& automation() const { return m_automation; }
     /// Those of the events that aren't written down here: they begin or end elsewhere, play from elsewhere in their clips, or
     /// have another name, clip or content. Nothing else of an event is compared, and of a record of earlier projects only the
     /// place, or that and the name.
@@ -87,20 +87,19 @@ private:
     PreviewRecord(const Head& head, Compared compared) : m_head(head), m_compared(compared) {}
     static std::optional<PreviewRecord> ofPlaces(const Numbers& numbers);
     static std::optional<PreviewRecord> ofNames(const Numbers& numbers);
+    static std::optional<PreviewRecord> ofContents(const StoredHead& head, const Track& track);
     Event numbersOf(Velmark::IProjectNode& event) const;
     Known knownOf(const Event& event) const;
     void add(const Event& event);
     void add(const Numbers& events, std::size_t from);
     void reachTo(double time);
-    /// Of the third attribute.
-    double checksumOfCurves(const Numbers& curves) const;
     bool isSound() const;
 
     Head m_head;
     Compared m_compared;
     std::map<Known, std::int64_t> m_events; ///< and how many of them are there
     Numbers m_numbers;                      ///< of each event, as they are stored
-    std::optional<Numbers> m_curves;        ///< nothing where they aren't known
+    WrittenAutomation m_automation;
 };
 
 /// The events and parts of a track that lie in a stretch or reach into it, in seconds from the time origin.

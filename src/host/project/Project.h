@@ -193,8 +193,8 @@ public:
     void rememberWritten();
     /// Unlocks the tracks, takes away what is kept as written, and shows no events any more. What the user has laid there
     /// since stays, and so does what he has moved, renamed, slipped or given another length, clip or content; a copy that he
-    /// has changed in no other way than by its gain or the like goes. Automation goes from the start of what was written on
-    /// its track, on the curves on which something was.
+    /// has changed in no other way than by its gain or the like goes. Of automation, points stay that he has drawn, moved or
+    /// given another value, and one at the start of what was written keeps the curve before them level.
     void clearPreview(Velmark::IEditTransaction& transaction);
 
     /// What a run replaces, in seconds of the project's clock: the day that timecodes can name, and of that the range to which

@@ -9,6 +9,7 @@
 #include "host/project/EventPrint.h"
 #include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
+#include "host/track/HeldPoint.h"
 #include "host/track/Instant.h"
 #include "velmark/Automation.h"
 #include "velmark/Editing.h"
@@ -16,6 +17,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <iterator>
 #include <map>
 #include <set>
 #include <utility>
@@ -41,6 +43,8 @@ public:
             m_taken.emplace_back(parent, child);
         }
     }
+    /// Puts something new in with them, in the order in which this is called.
+    void add(const Node& parent, const Node& child) { m_taken.emplace_back(parent, child); }
     /// Puts all of it back, and throws the first failure at the end.
     void putBack()
     {
@@ -85,19 +89,53 @@ std::vector<Node> withThoseBeside(const Track& track, const std::vector<Node>& e
     return all;
 }
 
-/// Takes off what the system hasn't written in a stretch. The record is null for a track that has written nothing there. All
-/// automation on a curve on which something is written counts as the system's.
-void takeUsersOff(SparedContent& spared, const Track& track, const PreviewRecord* record,
-                  const core::SecondsRange& stretch)
+/// Takes off the events that the system hasn't written in a stretch. The record is null for a track that has written nothing
+/// there.
+void takeUsersEventsOff(SparedContent& spared, const Track& track, const PreviewRecord* record,
+                        const core::SecondsRange& stretch)
 {
     std::vector<Node> events = eventsReachingInto(track, stretch.start, stretch.end);
     if (record)
         events = MemoSync::othersThan(*record, std::move(events));
     spared.takeOff(track.container(), withThoseBeside(track, events, stretch.start));
-    for (const Node& curve : curvesOf(*track.node())) {
-        if (!record || !record->hasWrittenOn(required(query<IEnvelopeTrack>(curve))->curveNumber()))
-            spared.takeOff(curve, pointsIn(*curve, stretch));
+}
+
+float valueOf(const Node& point)
+{
+    return required(query<IAutomationPoint>(point))->getValue();
+}
+
+//                film                 stretch
+//     before     o-----o----------|---w---w...u..w---w        w: the system's, u: the user's
+//     after      o-----o----------h..........u-------         h: what the film has come to
+
+/// Removes what the system has written on a curve, and takes what the user has drawn in a stretch off. Where he has, the film
+/// would be led to that from its last point on, so that a point at the start of the stretch keeps it level.
+void clearCurve(IHostContext* context, IEditTransaction& transaction, SparedContent& spared, const Node& curve,
+                const PreviewRecord* record, const core::SecondsRange& stretch)
+{
+    const std::vector<Node> all = childrenOf(*curve);
+    const auto isInFilm = [&](const Node& point) { return isBefore(point->getStart(nullptr), stretch.start); };
+    const auto first = std::ranges::find_if_not(all, isInFilm);
+    std::vector<Node> points(first, all.end());
+    std::vector<Node> users = record ? record->automation().others(*curve, points) : points;
+    const bool hasWritten = users.size() < points.size();
+    for (auto next = users.begin(); const Node& point : points) {
+        if (next != users.end() && point == *next)
+            ++next;
+        else
+            requireOk(transaction.remove(curve.get(), point.get()));
     }
+    if (hasWritten && !users.empty() && first != all.begin()) {
+        const float value = valueOf(*std::prev(first));
+        if (valueOf(users.front()) != value) {
+            const Node held = makePoint(context, *curve, stretch.start, value);
+            markAsHeld(*held, value);
+            spared.add(curve, held);
+        }
+    }
+    std::erase_if(users, [&](const Node& point) { return !isBefore(point->getStart(nullptr), stretch.end); });
+    spared.takeOff(curve, users);
 }
 
 } // namespace
@@ -186,9 +224,10 @@ void Project::clearWritten(IEditTransaction& transaction, const std::vector<Trac
             for (std::size_t index = 0; index < tracks.size(); ++index) {
                 const auto& record = records[index];
                 const bool hasWrittenThere = record && toInstant(record->start()) == toInstant(emptied.start);
-                takeUsersOff(spared, tracks[index], hasWrittenThere ? &*record : nullptr, emptied);
-                if (hasWrittenThere)
-                    removePoints(transaction, tracks[index], emptied);
+                const PreviewRecord* const written = hasWrittenThere ? &*record : nullptr;
+                takeUsersEventsOff(spared, tracks[index], written, emptied);
+                for (const Node& curve : curvesOf(*tracks[index].node()))
+                    clearCurve(m_hostContext, transaction, spared, curve, written, emptied);
             }
             deleteRange(transaction, emptied.start + timeOrigin(), emptied.end + timeOrigin());
         });

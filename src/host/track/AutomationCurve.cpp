@@ -5,14 +5,12 @@
 #include "core/time/SecondsRange.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
+#include "host/track/HeldPoint.h"
 #include "host/track/Instant.h"
-#include "velmark/Attributes.h"
 #include "velmark/Automation.h"
-#include "velmark/ClassId.h"
 #include "velmark/Context.h"
 #include "velmark/Editing.h"
 
-#include <bit>
 #include <cmath>
 #include <utility>
 
@@ -24,19 +22,6 @@ namespace {
 
 /// Values of a curve that are closer than this are the same.
 constexpr double SameValue = 1e-7;
-
-int64 bitsOf(float value)
-{
-    return std::bit_cast<std::uint32_t>(value);
-}
-
-/// Whether the system has written a point that still has its value.
-bool isOwn(IProjectNode& point, double value)
-{
-    FVariant held;
-    return point.getAttribute(AttributeKey::HeldValue, held) == ResultOk && held.isInteger() &&
-           held.asInteger() == bitsOf(static_cast<float>(value));
-}
 
 } // namespace
 
@@ -71,9 +56,7 @@ void AutomationCurve::fill(IHostContext* context, IEditTransaction& transaction,
         return;
     // Whoever wants it filled wants these points: none of them goes again by itself.
     replace(context, transaction, firstAt(start), firstAfter(end),
-            {{start, valueBefore(start)}, {end, valueBehind(end)}});
-    for (const Point* const point : {&m_left[m_left.size() - 2], &m_left.back()})
-        requireOk(point->node->removeAttribute(AttributeKey::HeldValue));
+            {{start, valueBefore(start), true}, {end, valueBehind(end), true}});
 }
 
 void AutomationCurve::hold(IHostContext* context, IEditTransaction& transaction, double start, double end)
@@ -114,7 +97,7 @@ void AutomationCurve::dropNeedless(IEditTransaction& transaction, double start, 
 {
     partAt(firstAt(start));
     while (!m_right.empty() && !isBefore(end, m_right.back().time)) {
-        if (isNextNeedless() && isOwn(*m_right.back().node, m_right.back().value)) {
+        if (isNextNeedless() && isHeld(*m_right.back().node, static_cast<float>(m_right.back().value))) {
             requireOk(transaction.remove(m_curve.get(), m_right.back().node.get()));
             m_right.pop_back();
         } else {
@@ -211,7 +194,7 @@ void AutomationCurve::replace(IHostContext* context, IEditTransaction& transacti
         m_right.pop_back();
     }
     for (const Place& place : places)
-        m_left.push_back(insertPoint(context, transaction, place.time, place.value));
+        m_left.push_back(insertPoint(context, transaction, place));
 }
 
 void AutomationCurve::partAt(std::size_t index)
@@ -275,17 +258,15 @@ double AutomationCurve::valueBehind(double time) const
     return index > firstAt(time) ? at(index - 1).value : valueBetween(index, time);
 }
 
-AutomationCurve::Point AutomationCurve::insertPoint(IHostContext* context, IEditTransaction& transaction, double time,
-                                                    double value) const
+AutomationCurve::Point AutomationCurve::insertPoint(IHostContext* context, IEditTransaction& transaction,
+                                                    const Place& place) const
 {
-    const auto point = required(create<IAutomationPoint>(context, ClassId::AutomationPoint));
-    const auto node = required(query<IProjectNode>(point));
-    const auto held = static_cast<float>(value);
-    requireOk(point->setValue(held));
-    requireOk(node->setStart(m_curve.get(), 0, time - m_origin));
-    requireOk(node->setAttribute(AttributeKey::HeldValue, FVariant::integer(bitsOf(held)), true));
+    const auto value = static_cast<float>(place.value);
+    auto node = makePoint(context, *m_curve, place.time - m_origin, value);
+    if (!place.isForGood)
+        markAsHeld(*node, value);
     requireOk(transaction.insert(m_curve.get(), node.get()));
-    return {time, held, node};
+    return {place.time, value, std::move(node)};
 }
 
 } // namespace cadrel::host

@@ -72,6 +72,7 @@ private:
     struct Place {
         double time;
         double value;
+        bool isForGood = false; ///< also where the curve runs the same without it
     };
 
     std::size_t size() const { return m_left.size() + m_right.size(); }
@@ -107,8 +108,7 @@ private:
     /// Puts new points in the place of those from `first` up to `last`, by index.
     void replace(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, std::size_t first,
                  std::size_t last, const std::vector<Place>& places);
-    Point insertPoint(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, double time,
-                      double value) const;
+    Point insertPoint(Velmark::IHostContext* context, Velmark::IEditTransaction& transaction, const Place& place) const;
 
     Velmark::Counted<Velmark::IProjectNode> m_curve;
     double m_origin;

@@ -127,11 +127,14 @@ void NotesReplay::lookAtMoveEnd(const json& row, std::size_t reel)
 void NotesReplay::carryOut(const json& step, std::size_t reel)
 {
     check(intOf(step, "number") == ++m_steps, "number", step);
+    const auto target = static_cast<std::size_t>(intOf(step.at("at"), "reel") - 1);
+    if (step.at("action") != "move-reel" && m_tables.at(target).empty())
+        m_bases.at(target) = timeOf(step.at("at").at("timecode")) - intOf(step.at("at"), "frame");
     const int before = static_cast<int>(m_tables[reel].size());
     m_removed.clear();
     m_inserted.clear();
     if (step.at("action") == "move-reel")
-        moveReel(step, reel);
+        moveReel(step);
     placeIn(step.at("at"));
     if (step.at("action") == "move")
         move(step);
@@ -140,11 +143,26 @@ void NotesReplay::carryOut(const json& step, std::size_t reel)
     check(intOf(step, "lengthChangeFrames") == static_cast<int>(m_tables[reel].size()) - before, "change of length",
           step);
     lookAtChanges(step);
+    lookAtTimeline(step);
 }
 
-/// Before it the reel begins where it did, and after it where it does now.
-void NotesReplay::moveReel(const json& step, std::size_t reel)
+/// No reel lies on another where all of them are on one timeline.
+void NotesReplay::lookAtTimeline(const json& step)
 {
+    std::vector<std::pair<int, int>> reels;
+    for (std::size_t reel = 0; reel < m_tables.size(); ++reel) {
+        if (!m_tables[reel].empty())
+            reels.emplace_back(m_bases[reel], m_bases[reel] + static_cast<int>(m_tables[reel].size()));
+    }
+    std::sort(reels.begin(), reels.end());
+    for (std::size_t next = 1; next < reels.size(); ++next)
+        check(reels[next - 1].second <= reels[next].first, "a reel lies on another", step);
+}
+
+/// Before it the reel begins where it did until then.
+void NotesReplay::moveReel(const json& step)
+{
+    const auto reel = static_cast<std::size_t>(intOf(step.at("at"), "reel") - 1);
     check(placeIn(step.at("from")) == reel && intOf(step.at("from"), "frame") == 0, "where a reel began", step);
     m_bases.at(reel) += intOf(step.at("changes").at(0), "frames");
     check(placeIn(step.at("at")) == reel && intOf(step.at("at"), "frame") == 0, "where a reel begins", step);

@@ -51,7 +51,8 @@ private:
     void carryOutRow(const nlohmann::json& row, std::size_t reel);
     void lookAtMoveEnd(const nlohmann::json& row, std::size_t reel);
     void carryOut(const nlohmann::json& step, std::size_t reel);
-    void moveReel(const nlohmann::json& step, std::size_t reel);
+    void moveReel(const nlohmann::json& step);
+    void lookAtTimeline(const nlohmann::json& step);
     void replace(const nlohmann::json& step);
     void move(const nlohmann::json& step);
     void lookAtChanges(const nlohmann::json& step);

@@ -266,7 +266,15 @@ std::string PrintedNotes::cutLine(const char* side) const
 
 std::string PrintedNotes::cuts() const
 {
-    return cutName("old") + " to " + cutName("new");
+    const auto titleOf = [this](const char* side) {
+        const json& titles = m_notes.at(side).at("titles");
+        if (titles.empty())
+            return cutName(side);
+        const std::string first = titles.front();
+        return titles.size() == 1 ? first : first + " ... " + titles.back().get<std::string>();
+    };
+    const bool areApart = titleOf("old") != titleOf("new");
+    return (areApart ? titleOf("old") : cutName("old")) + " to " + (areApart ? titleOf("new") : cutName("new"));
 }
 
 std::string PrintedNotes::headBeforeSettings(Form form) const
@@ -422,7 +430,8 @@ PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
                     materialOf(change) + newTransition + former};
     }
     if (kind == "reel-moved")
-        return {time + (frames < 0 ? " earlier" : " later"), "the whole reel", {}};
+        return {time + (frames < 0 ? " earlier" : " later"), "the whole reel",
+                change.contains("outOfTheWay") ? "out of the way until its own steps" : ""};
     if (kind == "version-changed")
         return {"was " + cutTo(was.at(matched), 28), cutTo(now.at(matched), ColumnsOfAName), {}};
     if (kind == "transition-added")
@@ -510,7 +519,7 @@ std::string PrintedNotes::actionOf(const json& row, std::size_t reel) const
                (goesOn(row, reel) ? " to " + row.at("at").at("timecode").get<std::string>()
                                   : " from " + row.at("from").at("timecode").get<std::string>());
     if (row.at("action") == "move-reel")
-        return "move the whole reel to " + row.at("at").at("timecode").get<std::string>();
+        return line({"move", wholeReel(row), "to", row.at("at").at("timecode")});
     if (row.at("action") == "relabel")
         return "new version, " + length(row, "insertFrames");
     const int removed = row.at("deleteFrames");
@@ -520,6 +529,14 @@ std::string PrintedNotes::actionOf(const json& row, std::size_t reel) const
     if (inserted == 0)
         return "delete " + timecodeOfFrames(removed);
     return "replace " + timecodeOfFrames(removed) + (inserted == removed ? "" : " by " + timecodeOfFrames(inserted));
+}
+
+/// Of several reels, its number.
+std::string PrintedNotes::wholeReel(const json& step) const
+{
+    if (m_notes.at("reels").size() == 1)
+        return "the whole reel";
+    return std::string("all of reel ").append(std::to_string(step.at("at").at("reel").get<int>()));
 }
 
 std::string PrintedNotes::action(int step) const
@@ -624,6 +641,17 @@ std::string PrintedNotes::reelList(Form form) const
     return text;
 }
 
+/// The last step that has moved all of a reel, where it stands among those of another.
+std::string PrintedNotes::moverOf(std::size_t reel) const
+{
+    std::string text;
+    for (const auto& [number, step] : m_steps) {
+        if (step.row->at("action") == "move-reel" && step.row->at("at").at("reel") == static_cast<int>(reel) + 1)
+            text = step.reel == reel ? std::string() : std::string(", moved by step ").append(std::to_string(number));
+    }
+    return text;
+}
+
 std::string PrintedNotes::reelHeading(std::size_t reel, Form form) const
 {
     const json& pair = m_notes.at("reels")[reel];
@@ -633,7 +661,7 @@ std::string PrintedNotes::reelHeading(std::size_t reel, Form form) const
     else if (pair.at("old").is_null())
         text += ", is new";
     else if (pair.at("old").at("start") != pair.at("new").at("start"))
-        text += ", began at " + pair.at("old").at("start").get<std::string>();
+        text += ", began at " + pair.at("old").at("start").get<std::string>() + moverOf(reel);
     const int before = framesOf(reel, "old");
     const int after = framesOf(reel, "new");
     const bool isUnchanged = std::all_of(pair.at("rows").begin(), pair.at("rows").end(),
@@ -858,7 +886,7 @@ std::string PrintedNotes::tableRow(const json& step, std::size_t reel) const
                                          largest.value("sourceIn", "")};
     std::string row;
     for (const std::string& cell : cells)
-        row += (row.empty() ? "" : ",") + inQuotes(cell);
+        row.append(row.empty() ? "" : ",").append(inQuotes(cell));
     return row + (step.contains("sound") ? soundCells(step.at("sound")) : "");
 }
 

@@ -55,6 +55,8 @@ private:
     std::string largest(Form form) const;
     std::string shotsOf(const nlohmann::json& step) const;
     std::string reelList(Form form) const;
+    std::string moverOf(std::size_t reel) const;
+    std::string wholeReel(const nlohmann::json& step) const;
     std::string reelHeading(std::size_t reel, Form form) const;
     std::string remarks() const;
     std::string soundOf(const nlohmann::json& sound, Form form) const;

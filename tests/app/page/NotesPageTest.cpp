@@ -10,7 +10,9 @@
 #include <gtest/gtest.h>
 #include <memory>
 #include <nlohmann/json.hpp>
+#include <regex>
 #include <set>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -607,6 +609,47 @@ TEST_F(NotesPage, TheChangesHaveRoomInAWindowOfAnyWidth)
     }
 }
 
+TEST_F(NotesPage, TheNumbersOfALineHaveNamesWhereTheTableHasNoHead)
+{
+    const auto nameOf = [this](const std::string& row, int column) {
+        return browser
+            .valueOf("getComputedStyle(document.querySelector('#" + row + " td:nth-child(" + std::to_string(column) +
+                     ")'), '::before').content")
+            .get<std::string>();
+    };
+    for (const int width : {420, 600, 900}) {
+        browser.resize(width, 800);
+
+        EXPECT_EQ(nameOf("s1", 5), "\"length \"") << width;
+        EXPECT_EQ(nameOf("s1", 6), "\"offset \"") << width;
+        EXPECT_EQ(nameOf("k1-1", 5), "none") << width;
+        EXPECT_EQ(nameOf("s1", 1), "none") << width;
+    }
+    browser.resize(901, 800);
+    EXPECT_EQ(nameOf("s1", 5), "none");
+}
+
+TEST_F(NotesPage, NoneOfTheLargestChangesIsTornOverTwoColumns)
+{
+    show(pageWithSound());
+    for (int width = 761; width <= 1240; width += 13) {
+        browser.resize(width, 900);
+
+        EXPECT_EQ(count("all('ol.largest li').filter(line => line.getClientRects().length > 1).length"), 0) << width;
+    }
+}
+
+TEST_F(NotesPage, ALongWordOfWhatToDoStaysInItsColumn)
+{
+    browser.valueOf("document.querySelector('#s1 td:nth-child(3)').textContent = "
+                    "'moved 00:00:21:07 from reel 12, step 1175'");
+    for (const int width : {901, 1041, 1240}) {
+        browser.resize(width, 800);
+
+        EXPECT_EQ(count("all('.steps td').filter(cell => cell.scrollWidth > cell.clientWidth).length"), 0) << width;
+    }
+}
+
 TEST_F(NotesPage, NoNumberOfAReelLiesOnAnother)
 {
     // Reels of 20 s and of 40 s in turn.
@@ -660,6 +703,28 @@ TEST_F(NotesPage, PrintsEveryStep)
     }
     EXPECT_EQ(paper.find("zoom in"), std::string::npos);
     EXPECT_EQ(paper.find("Left out"), std::string::npos);
+}
+
+TEST_F(NotesPage, AStepWithMuchSoundGoesOnOverThePageOnPaper)
+{
+    show(pageWithSound());
+    const std::string file = s_folder->write("sound.pdf", browser.printed());
+
+    // Lines of 9 points on A4: a page that isn't the last one is filled down to its last third.
+    const Outcome boxes = runProgram("pdftotext", {"-bbox", file, "-"});
+    const std::regex word("<word [^>]*yMax=\"([0-9.]+)\"");
+    std::vector<double> bottoms;
+    std::istringstream lines(boxes.out);
+    for (std::string line; std::getline(lines, line);) {
+        std::smatch match;
+        if (line.find("<page ") != std::string::npos)
+            bottoms.push_back(0);
+        else if (std::regex_search(line, match, word))
+            bottoms.back() = std::max(bottoms.back(), std::stod(match[1]));
+    }
+    ASSERT_GT(bottoms.size(), 5U);
+    bottoms.pop_back();
+    EXPECT_GT(*std::min_element(bottoms.begin(), bottoms.end()), 560) << boxes.out.substr(0, 500);
 }
 
 TEST_F(NotesPage, TheColoursAreExplainedOnPaper)

@@ -261,7 +261,7 @@ TEST_F(ChangeNotesTest, ADoubledShotTellsWhereItStandsAsWell)
 
     EXPECT_EQ(textOf(film.steps()), Texts{"-0 +30 at 150: doubled 30;"});
     ASSERT_EQ(film.steps()[0].doubledFrom.size(), 1U);
-    EXPECT_EQ(film.steps()[0].doubledFrom[0], (WorkPlace{0, 20}));
+    EXPECT_EQ(film.steps()[0].doubledFrom[0], (WorkPlace{0, 20, Hour}));
 }
 
 TEST_F(ChangeNotesTest, AnotherSpeedIsARetime)
@@ -361,6 +361,97 @@ TEST_F(ChangeNotesTest, TheShotsOfANewDissolveMeetInItsMiddle)
     const Notes film(reelOf({{"A", 0, 100}, {"B", 20, 50}}), reelOf({{"A", 0, 54}, {"B", 14, 56, -1, 12}}));
 
     EXPECT_EQ(textOf(film.steps()), Texts{"-52 +12 at 54: transition in 12; tail -40;"});
+}
+
+/// A cut between two shots at `cut`, or a dissolve into the second one that begins there.
+EventList rolledTo(int cut, int dissolve)
+{
+    return reelOf({{"A", 0, cut}, {"B", cut, 200 - cut, -1, dissolve}});
+}
+
+TEST_F(ChangeNotesTest, ADissolveThatDoesNotReachTheOldCutTellsTheRollToo)
+{
+    const auto changes = [](int cut, int oldDissolve, int newDissolve) {
+        return textOf(Notes(rolledTo(100, oldDissolve), rolledTo(cut, newDissolve)).steps());
+    };
+
+    // Of 16 frames, its middle is 8 frames after its start.
+    EXPECT_EQ(changes(100, 0, 16), Texts{"-16 +16 at 100: transition in 16;"});
+    EXPECT_EQ(changes(101, 0, 16), Texts{"-17 +17 at 100: transition in 16; tail 9; head -9;"});
+    EXPECT_EQ(changes(150, 0, 16), Texts{"-66 +66 at 100: transition in 16; tail 58; head -58;"});
+    EXPECT_EQ(changes(84, 0, 16), Texts{"-16 +16 at 84: transition in 16;"});
+    EXPECT_EQ(changes(83, 0, 16), Texts{"-17 +17 at 83: transition in 16; tail -9; head 9;"});
+    // Of 15 it is 7 frames after it.
+    EXPECT_EQ(changes(85, 0, 15), Texts{"-15 +15 at 85: transition in 15;"});
+    EXPECT_EQ(changes(84, 0, 15), Texts{"-16 +16 at 84: transition in 15; tail -9; head 9;"});
+}
+
+TEST_F(ChangeNotesTest, ADissolveThatGoesOrChangesItsLengthTellsARollThatIsLongerThanItsHalf)
+{
+    const auto changes = [](int cut, int oldDissolve, int newDissolve) {
+        return textOf(Notes(rolledTo(100, oldDissolve), rolledTo(cut, newDissolve)).steps());
+    };
+
+    EXPECT_EQ(changes(116, 16, 0), Texts{"-16 +16 at 100: transition out 0;"});
+    EXPECT_EQ(changes(117, 16, 0), Texts{"-17 +17 at 100: transition out 0; tail 9; head -9;"});
+    // From 108 to 116, and one more.
+    EXPECT_EQ(changes(112, 16, 8), Texts{"-20 +20 at 100: transition 8;"});
+    EXPECT_EQ(changes(113, 16, 8), Texts{"-21 +21 at 100: transition 8; tail 9; head -9;"});
+}
+
+TEST_F(ChangeNotesTest, AFreezeWithADissolveThatChangesItsLengthIsATrim)
+{
+    for (const int srcLength : {0, 1}) {
+        const auto cut = [srcLength](int length) {
+            return reelOf({{"A", 0, 100}, {"F", 7, length, srcLength, 16}, {"B", 0, 50}});
+        };
+
+        EXPECT_EQ(textOf(Notes(cut(60), cut(40)).steps()), Texts{"-20 +0 at 140: tail -20;"}) << srcLength;
+        EXPECT_EQ(textOf(Notes(cut(17), cut(48)).steps()), Texts{"-0 +31 at 117: tail 31;"}) << srcLength;
+    }
+    // A shot that runs isn't the freeze of its first frame.
+    EXPECT_EQ(
+        textOf(
+            Notes(reelOf({{"A", 0, 100}, {"F", 7, 60, 1, 16}}), reelOf({{"A", 0, 100}, {"F", 7, 60, -1, 16}})).steps())
+            .size(),
+        1U);
+}
+
+TEST_F(ChangeNotesTest, AShortShotAtASpeedOfItsOwnThatIsTrimmedKeepsItsSpeed)
+{
+    const auto trimmed = [](const Shot& was, const Shot& is) {
+        return textOf(
+            Notes(reelOf({{"A", 0, 100}, was, {"B", 0, 50}}), reelOf({{"A", 0, 100}, is, {"B", 0, 50}})).steps());
+    };
+
+    // The source is cut at whole frames: 11.5 are 12.
+    EXPECT_EQ(trimmed({"S", 0, 24, 12}, {"S", 0, 23, 12}), Texts{"-1 +0 at 123: tail -1;"});
+    EXPECT_EQ(trimmed({"S", 0, 48, 12}, {"S", 0, 46, 12}), Texts{"-2 +0 at 146: tail -2;"});
+    EXPECT_EQ(trimmed({"S", 0, 20, 30}, {"S", 0, 19, 29}), Texts{"-1 +0 at 119: tail -1;"});
+    // Its end stays, so that its head is what is trimmed.
+    EXPECT_EQ(trimmed({"S", 0, 24, 12}, {"S", 1, 23, 11}), Texts{"-1 +0 at 100: head -1;"});
+    EXPECT_EQ(trimmed({"S", 0, 24, 12, 8}, {"S", 0, 23, 12, 8}), Texts{"-1 +0 at 123: tail -1;"});
+    // A whole frame more is another speed.
+    EXPECT_EQ(trimmed({"S", 0, 24, 12}, {"S", 0, 24, 13}), Texts{"-24 +24 at 100: retimed 24;"});
+    EXPECT_EQ(trimmed({"S", 0, 24, 24}, {"S", 0, 23, 24}), Texts{"-24 +23 at 100: retimed 23;"});
+}
+
+TEST_F(ChangeNotesTest, AShotThatComesOrGoesHasItsHalfOfTheTransitionAfterIt)
+{
+    // 60 frames of N come before the dissolve, and 8 within its first half; C loses these 8.
+    EXPECT_EQ(textOf(Notes(reelOf({{"A", 0, 100}, {"C", 20, 80}}),
+                           reelOf({{"A", 0, 100}, {"N", 0, 60}, {"C", 20, 80, -1, 16}}))
+                         .steps()),
+              Texts{"-16 +76 at 100: transition in 16; inserted 68; head -8;"});
+    EXPECT_EQ(textOf(Notes(reelOf({{"A", 0, 100}, {"N", 0, 60}, {"C", 20, 80, -1, 16}}),
+                           reelOf({{"A", 0, 100}, {"C", 20, 80}}))
+                         .steps()),
+              Texts{"-76 +16 at 100: transition out 0; lifted 68; head 8;"});
+    // 100 frames give way to 108.
+    EXPECT_EQ(textOf(Notes(reelOf({{"A", 0, 50}, {"B", 0, 100}, {"C", 20, 80}}),
+                           reelOf({{"A", 0, 50}, {"N", 0, 100}, {"C", 20, 80, -1, 16}}))
+                         .steps()),
+              Texts{"-116 +116 at 50: transition in 16; lifted 100; inserted 108; head -8;"});
 }
 
 TEST_F(ChangeNotesTest, AFreezeOfASourceFrameThatGetsLongerIsATrim)
@@ -611,7 +702,7 @@ TEST_F(ChangeNotesTest, AChangeInOneReelLeavesTheNextWhereItIs)
 
     ASSERT_EQ(film.notes.reels().size(), 2U);
     EXPECT_EQ(textOf(film.steps()), (Texts{"-10 +0 at 90: tail -10;", "-0 +7 at 100: inserted 7;"}));
-    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].place, 1), 2 * Hour + 100);
+    EXPECT_EQ(film.steps()[1].place.timecode(), 2 * Hour + 100);
     EXPECT_EQ(film.notes.reels()[1].entries.front().runningOffset, 0);
 }
 
@@ -636,8 +727,8 @@ TEST_F(ChangeNotesTest, AShotThatGoesToAnotherReelIsTakenOutOfItsOwn)
 
     const auto steps = film.steps();
     ASSERT_EQ(steps.size(), 1U);
-    EXPECT_EQ(steps[0].from, (WorkPlace{0, 100}));
-    EXPECT_EQ(steps[0].place, (WorkPlace{1, 100}));
+    EXPECT_EQ(steps[0].from, (WorkPlace{0, 100, Hour}));
+    EXPECT_EQ(steps[0].place, (WorkPlace{1, 100, 2 * Hour}));
     EXPECT_EQ(film.notes.reels()[0].entries.back().runningOffset, -20);
     EXPECT_EQ(film.notes.reels()[1].entries.back().runningOffset, 20);
 
@@ -646,7 +737,7 @@ TEST_F(ChangeNotesTest, AShotThatGoesToAnotherReelIsTakenOutOfItsOwn)
     const NoteEntry& entry = film.notes.reels()[1].entries[1];
     const MoveEnd* const end = entry.moveEnd();
     ASSERT_NE(end, nullptr);
-    EXPECT_EQ(end->place, (WorkPlace{1, 100}));
+    EXPECT_EQ(end->place, (WorkPlace{1, 100, 2 * Hour}));
     EXPECT_TRUE(end->isTarget);
     EXPECT_EQ(end->otherReel, 0U);
     EXPECT_EQ(end->step, 1U);
@@ -668,7 +759,7 @@ TEST_F(ChangeNotesTest, AReelThatGivesAShotToAnEarlierOneTellsOfIt)
     ASSERT_EQ(film.notes.reels()[1].entries.size(), 3U);
     const MoveEnd* const end = film.notes.reels()[1].entries[1].moveEnd();
     ASSERT_NE(end, nullptr);
-    EXPECT_EQ(end->place, (WorkPlace{1, 100}));
+    EXPECT_EQ(end->place, (WorkPlace{1, 100, 2 * Hour}));
     EXPECT_FALSE(end->isTarget);
     EXPECT_EQ(end->otherReel, 0U);
     EXPECT_EQ(end->step, 1U);
@@ -774,7 +865,7 @@ TEST_F(ChangeNotesTest, AReelThatBeginsElsewhereIsMovedThereFirst)
 
     EXPECT_EQ(textOf(film.steps()),
               (Texts{"reel at 0: reel later -200;", "-0 +200 at 0: inserted 200;", "-50 +0 at 300: lifted 50;"}));
-    EXPECT_EQ(film.notes.timecodeOf(film.steps()[2].place, 0), Hour + 100);
+    EXPECT_EQ(film.steps()[2].place.timecode(), Hour + 100);
     EXPECT_FALSE(film.notes.reels()[0].isUnchanged());
     EXPECT_EQ(film.notes.totals().moved, 0);
     EXPECT_EQ(film.notes.reels()[0].entries[0].number, 1U);
@@ -799,9 +890,105 @@ TEST_F(ChangeNotesTest, AMoveFromALaterReelIsCountedFromItsOldStart)
 
     ASSERT_EQ(textOf(film.steps()), (Texts{"reel at 0: reel later 7;", "20 from 100 at 100: moved 20;",
                                            "reel at 0: reel later " + std::to_string(Hour) + ";"}));
-    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].from, 0), 2 * Hour + 100);
-    EXPECT_EQ(film.notes.timecodeOf(film.steps()[1].place, 0), Hour + 107);
-    EXPECT_EQ(film.notes.timecodeOf(film.notes.reels()[1].entries[2].moveEnd()->place, 1), 3 * Hour + 100);
+    EXPECT_EQ(film.steps()[1].from.timecode(), 2 * Hour + 100);
+    EXPECT_EQ(film.steps()[1].place.timecode(), Hour + 107);
+    EXPECT_EQ(film.notes.reels()[1].entries[2].moveEnd()->place.timecode(), 3 * Hour + 100);
+}
+
+constexpr int Minute = 1500;
+
+/// "reel 2 to 125" of each step that moves a reel, in minutes, with a "~" where it is out of the way; a "." for any other one.
+Texts movesOf(const Notes& film)
+{
+    Texts texts;
+    for (const NoteStep& step : film.steps()) {
+        if (step.action != StepAction::MoveReel)
+            texts.emplace_back(".");
+        else
+            texts.push_back("reel " + std::to_string(step.place.reel + 1) + " to " +
+                            std::to_string(step.place.timecode() / Minute) +
+                            (step.changes.front().isOutOfTheWay ? "~" : ""));
+    }
+    return texts;
+}
+
+/// Reels that begin at these minutes.
+EventList timelineOf(const std::vector<std::pair<int, std::vector<Shot>>>& reels)
+{
+    EventList film;
+    for (const auto& [minute, shots] : reels)
+        film.append(reelOf(shots, minute * Minute));
+    return film;
+}
+
+TEST_F(ChangeNotesTest, ReelsThatGoLaterGoFromTheLastBeforeOneThatGrowsReachesThem)
+{
+    const std::vector<Shot> second{{"B", 0, 18 * Minute}};
+    const std::vector<Shot> third{{"C", 0, 18 * Minute}};
+    const Notes film(timelineOf({{60, {{"A", 0, 18 * Minute}}}, {80, second}, {100, third}}),
+                     timelineOf({{60, {{"A", 0, 9 * Minute}, {"N", 0, 3 * Minute}, {"A", 9 * Minute, 9 * Minute}}},
+                                 {85, second},
+                                 {105, third}}));
+
+    EXPECT_EQ(movesOf(film), (Texts{"reel 3 to 105", "reel 2 to 85", "."}));
+    EXPECT_EQ(film.notes.reels()[0].entries.size(), 5U);
+    EXPECT_EQ(film.notes.reels()[1].movedBy, 2U);
+    EXPECT_EQ(film.notes.reels()[2].movedBy, 1U);
+    EXPECT_FALSE(film.notes.reels()[1].isUnchanged());
+}
+
+TEST_F(ChangeNotesTest, AReelThatGoesEarlierWaitsUntilTheOneBeforeItHasShrunk)
+{
+    const std::vector<Shot> second{{"B", 0, 18 * Minute}};
+    const Notes film(timelineOf({{60, {{"A", 0, 18 * Minute}}}, {80, second}}),
+                     timelineOf({{60, {{"A", 0, 10 * Minute}}}, {72, second}}));
+
+    EXPECT_EQ(movesOf(film), (Texts{".", "reel 2 to 72"}));
+    EXPECT_EQ(film.notes.reels()[1].movedBy, 0U);
+}
+
+TEST_F(ChangeNotesTest, ReelsThatChangePlacesGoOverAFreeOne)
+{
+    const std::vector<Shot> first{{"A", 0, 4 * Minute}};
+    const std::vector<Shot> second{{"B", 0, 6 * Minute}};
+    const Notes film(timelineOf({{60, first}, {70, second}}), timelineOf({{60, second}, {70, first}}));
+
+    // The last one ends at 76 minutes.
+    EXPECT_EQ(movesOf(film), (Texts{"reel 2 to 80~", "reel 1 to 60", "reel 2 to 70"}));
+}
+
+TEST_F(ChangeNotesTest, AReelWaitsElsewhereWhileTheOneBeforeItIsLongerForAMoment)
+{
+    const std::vector<Shot> second{{"B", 0, 5 * Minute}};
+    const std::vector<Shot> was{{"A", 0, 5 * Minute}, {"X", 0, 3 * Minute}};
+    const std::vector<Shot> is{{"N", 0, 3 * Minute}, {"A", 0, 5 * Minute}};
+    const Notes film(timelineOf({{60, was}, {70, second}}), timelineOf({{60, is}, {70, second}}));
+
+    EXPECT_EQ(movesOf(film), (Texts{"reel 2 to 80~", ".", ".", "reel 2 to 70"}));
+    // At 72 minutes it isn't in the way: reel 1 has 11 minutes between its steps.
+    EXPECT_EQ(movesOf(Notes(timelineOf({{60, was}, {71, second}}), timelineOf({{60, is}, {71, second}}))),
+              (Texts{".", "."}));
+}
+
+TEST_F(ChangeNotesTest, AReelOntoWhoseOldPlaceAnEarlierOneGoesIsMovedFirst)
+{
+    const std::vector<Shot> first{{"A", 0, 2 * Minute}};
+    const std::vector<Shot> second{{"B", 0, 2 * Minute}};
+    const Notes film(timelineOf({{60, first}, {70, second}}), timelineOf({{70, first}, {80, second}}));
+
+    EXPECT_EQ(movesOf(film), (Texts{"reel 2 to 80", "reel 1 to 70"}));
+    EXPECT_EQ(film.steps()[0].from.timecode(), 70 * Minute);
+    EXPECT_EQ(film.notes.reels()[0].entries[0].number, 1U);
+    EXPECT_EQ(film.notes.reels()[0].entries[1].number, 2U);
+}
+
+TEST_F(ChangeNotesTest, AReelThatIsGoneIsTakenOutBeforeALaterOneComesToItsPlace)
+{
+    const std::vector<Shot> last{{"C", 0, 2 * Minute}};
+    const Notes film(timelineOf({{60, {{"A", 0, Minute}}}, {70, {{"B", 0, Minute}}}, {80, last}}),
+                     timelineOf({{60, {{"A", 0, Minute}}}, {70, last}}));
+
+    EXPECT_EQ(movesOf(film), (Texts{".", "reel 3 to 70"}));
 }
 
 /// A film of reels of one shot, each at its hour.
@@ -829,7 +1016,7 @@ Texts pairsOf(const Notes& film)
 TEST_F(ChangeNotesTest, AReelThatIsGoneAndANewOneAtAnotherPlaceAreNoPair)
 {
     EXPECT_EQ(pairsOf(Notes(reelsOf({{"A", 1}, {"X", 2}, {"B", 3}}), reelsOf({{"A", 1}, {"B", 3}, {"Y", 4}}))),
-              (Texts{"1 to 1", "3 to 2", "new 3", "gone 2"}));
+              (Texts{"1 to 1", "gone 2", "3 to 2", "new 3"}));
 }
 
 TEST_F(ChangeNotesTest, ReelsWithoutCommonPictureThatBeginAtTheSameTimeAreAPair)
@@ -846,7 +1033,7 @@ TEST_F(ChangeNotesTest, ReelsWithoutCommonPictureBetweenTheSameReelsArePairs)
     // One more between them.
     EXPECT_EQ(
         pairsOf(Notes(reelsOf({{"A", 1}, {"X", 2}, {"B", 6}}), reelsOf({{"A", 1}, {"Y", 3}, {"Z", 5}, {"B", 6}}))),
-        (Texts{"1 to 1", "new 2", "new 3", "3 to 4", "gone 2"}));
+        (Texts{"1 to 1", "gone 2", "new 2", "new 3", "3 to 4"}));
     EXPECT_EQ(pairsOf(Notes(reelsOf({{"X", 1}}), reelsOf({{"Y", 2}}))), Texts{"1 to 1"});
 }
 
@@ -919,7 +1106,7 @@ TEST_F(ChangeNotesTest, ADoubledShotOfAnotherVersionIsAChangeOfItsOwn)
 
     ASSERT_EQ(textOf(film.steps()), Texts{"-0 +190 at 199: doubled 100; doubled 50; doubled 40;"});
     const auto doubledFrom = film.steps()[0].doubledFrom;
-    EXPECT_EQ(doubledFrom, (std::vector<WorkPlace>{{0, 0}, {0, 100}, {0, 150}}));
+    EXPECT_EQ(doubledFrom, (std::vector<WorkPlace>{{0, 0, Hour}, {0, 100, Hour}, {0, 150, Hour}}));
     EXPECT_EQ(film.steps()[0].changes[1].oldShot->rollName(), "VFX_1");
     EXPECT_EQ(film.steps()[0].changes[1].newShot->rollName(), "VFX_2");
 }
@@ -978,11 +1165,11 @@ TEST_F(ChangeNotesTest, ADissolveThatIsRemovedIsThatOfTheShotThatHadIt)
 
 TEST_F(ChangeNotesTest, AShotThatIsNotInADissolveIsNotTrimmedByIt)
 {
-    // B goes, out of which C came by a dissolve.
+    // B goes, out of which C came by a dissolve. 8 of its frames were in the first half of that.
     const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 90}, {"C", 0, 80, -1, 16}, {"D", 0, 50}}),
                      reelOf({{"A", 0, 100}, {"C", 16, 64}, {"D", 0, 50}}));
 
-    EXPECT_EQ(textOf(film.steps()), Texts{"-106 +0 at 100: transition out 0; lifted 90; head -8;"});
+    EXPECT_EQ(textOf(film.steps()), Texts{"-106 +0 at 100: transition out 0; lifted 98; head -8;"});
 }
 
 TEST_F(ChangeNotesTest, ADissolveOfTheSameLengthAtALaterPlaceTellsTheTrims)
@@ -997,7 +1184,7 @@ TEST_F(ChangeNotesTest, ADissolveOfOneLineIsComparedWithItsOutgoingShot)
     const Notes film(reelOf({{"A", 0, 100}, {"B", 0, 90, -1, 24}}), reelOf({{"C", 0, 100}, {"B", 0, 90, -1, 24}}));
 
     EXPECT_EQ(film.notes.totals().kept, 66);
-    EXPECT_EQ(textOf(film.steps()), Texts{"-124 +124 at 0: transition 24; replaced 100;"});
+    EXPECT_EQ(textOf(film.steps()), Texts{"-124 +124 at 0: transition 24; replaced 112;"});
 }
 
 TEST_F(ChangeNotesTest, TwoEmptyListsHaveNothingToTell)

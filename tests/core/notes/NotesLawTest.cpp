@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "core/edl/EventBase.h"
 #include "core/notes/ChangeNotes.h"
 #include "core/notes/KeptStretches.h"
 #include "core/notes/StepChanges.h"
@@ -14,7 +15,10 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <memory>
+#include <stdexcept>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace cadrel::tests {
@@ -28,7 +32,8 @@ StepList stepsBetween(const EventList& oldCut, const EventList& newCut, const Pi
     TextNumbers numbers;
     const Programme oldProgramme(oldCut, rules, numbers);
     const Programme newProgramme(newCut, rules, numbers);
-    StepList list = makeSteps(oldProgramme, newProgramme, findKeptStretches(oldProgramme, newProgramme));
+    StepList list =
+        makeSteps(oldProgramme, newProgramme, findKeptStretches(oldProgramme, newProgramme), rules.framerate);
     for (auto& rows : list.rows)
         joinTrims(rows, simplify, StepChanges(oldProgramme, newProgramme));
     return list;
@@ -92,6 +97,40 @@ std::string playAll(const EventList& oldCut, const EventList& newCut, const Pict
     return ends == moves.size() ? player.difference() : "a move between reels has no other end, or two";
 }
 
+/// One event for each reel, of so many frames at a frame of the day.
+EventList reelsOf(const std::vector<std::pair<int, int>>& startsAndLengths)
+{
+    EventList events;
+    for (const auto& [start, length] : startsAndLengths) {
+        auto event = std::make_shared<EventBase>();
+        event->setRollName(std::string("R").append(std::to_string(events.size())));
+        event->setTimecodes(Timecode(0), Timecode(length), Timecode(start), Timecode(start + length));
+        events.add(event);
+    }
+    return events;
+}
+
+TEST(NotesPlayer, RefusesAStepThatLaysOneReelOnAnother)
+{
+    const TestProject project(Framerate(25, 0));
+    const EventList cut = reelsOf({{90000, 100}, {92000, 100}});
+    const PictureRules rules{project.framerate, MatchBy::RollName, {}};
+    NoteStep insert;
+    insert.place = {0, 100, 90000};
+    insert.inserted = {0, 1};
+    NoteStep shift;
+    shift.action = StepAction::MoveReel;
+    shift.from = {0, 0, 90000};
+    shift.place = {0, 0, 91900};
+    shift.changes.resize(1);
+    shift.changes[0].frames = 1900;
+    NotesPlayer player(cut, cut, rules, {{0, 0}, {1, 1}});
+
+    EXPECT_NO_THROW(player.carryOut(shift));
+    insert.place.reelStart = 91900;
+    EXPECT_THROW(player.carryOut(insert), std::logic_error);
+}
+
 RC_GTEST_PROP(NotesLaw, TheStepsTurnTheOldCutIntoTheNewOne, ())
 {
     const auto seed = *genRecutSeed();
@@ -118,6 +157,29 @@ RC_GTEST_PROP(NotesLaw, JoinedTrimsTurnTheOldCutIntoTheNewOneToo, ())
     RC_LOG() << wrong;
     RC_ASSERT(wrong.empty());
     RC_ASSERT(countSteps(list) <= countSteps(stepsBetween(film.oldCut, film.newCut, film.rules)));
+}
+
+RC_GTEST_PROP(NotesLaw, OnOneTimelineNoReelLiesOnAnotherAtAnyMoment, ())
+{
+    const RandomTimeline film(*rc::gen::arbitrary<std::uint64_t>());
+    const TestProject project(film.rules.framerate);
+
+    const std::string wrong =
+        playAll(film.oldCut, film.newCut, film.rules, stepsBetween(film.oldCut, film.newCut, film.rules));
+
+    RC_LOG() << wrong;
+    RC_ASSERT(wrong.empty());
+}
+
+RC_GTEST_PROP(NotesLaw, OnOneTimelineTheOffsetsEndInTheChangeOfLength, ())
+{
+    const RandomTimeline film(*rc::gen::arbitrary<std::uint64_t>());
+    const TestProject project(film.rules.framerate);
+
+    const ChangeNotes notes(film.oldCut, film.newCut, film.rules);
+
+    for (const ReelNotes& reel : notes.reels())
+        RC_ASSERT(reel.entries.empty() || reel.entries.back().runningOffset == reel.after - reel.before);
 }
 
 RC_GTEST_PROP(NotesLaw, ACutHasNoStepsToItself, ())
@@ -175,7 +237,7 @@ RC_GTEST_PROP(NotesLaw, TheOffsetsEndInTheChangeOfLength, ())
 }
 
 /// A timecode that isn't that of the place at its step, or nothing.
-std::string wrongTimecode(const ChangeNotes& notes, const NotesPlayer& player, const NoteEntry& entry, std::size_t reel)
+std::string wrongTimecode(const NotesPlayer& player, const NoteEntry& entry)
 {
     std::vector<WorkPlace> places;
     if (const MoveEnd* const end = entry.moveEnd())
@@ -184,22 +246,20 @@ std::string wrongTimecode(const ChangeNotes& notes, const NotesPlayer& player, c
         places = step->doubledFrom;
         if (step->action != StepAction::MoveReel)
             places.push_back(step->place);
-        if (step->action == StepAction::Move)
+        if (step->action == StepAction::Move || step->action == StepAction::MoveReel)
             places.push_back(step->from);
     }
     for (const WorkPlace& place : places) {
-        if (notes.timecodeOf(place, reel) != player.timecodeAt(place))
+        if (place.timecode() != player.timecodeAt(place))
             return "reel " + std::to_string(place.reel) + ", frame " + std::to_string(place.frame) + " is at " +
-                   std::to_string(player.timecodeAt(place)) + " and not " +
-                   std::to_string(notes.timecodeOf(place, reel));
+                   std::to_string(player.timecodeAt(place)) + " and not " + std::to_string(place.timecode());
     }
     return {};
 }
 
-RC_GTEST_PROP(NotesLaw, TheTimecodesAreThoseOfTheProgrammeSoFar, ())
+template <typename Film>
+void lookAtTimecodes(const Film& film)
 {
-    const auto seed = *genRecutSeed();
-    const RandomRecut film(seed);
     const TestProject project(film.rules.framerate);
     const ChangeNotes notes(film.oldCut, film.newCut, film.rules);
     std::vector<ReelChange> reels;
@@ -209,7 +269,7 @@ RC_GTEST_PROP(NotesLaw, TheTimecodesAreThoseOfTheProgrammeSoFar, ())
 
     for (std::size_t reel = 0; reel < reels.size(); ++reel) {
         for (const NoteEntry& entry : notes.reels()[reel].entries) {
-            const std::string wrong = wrongTimecode(notes, player, entry, reel);
+            const std::string wrong = wrongTimecode(player, entry);
             RC_LOG() << wrong;
             RC_ASSERT(wrong.empty());
             if (entry.step() != nullptr)
@@ -217,6 +277,12 @@ RC_GTEST_PROP(NotesLaw, TheTimecodesAreThoseOfTheProgrammeSoFar, ())
         }
     }
     RC_ASSERT(player.difference().empty());
+}
+
+RC_GTEST_PROP(NotesLaw, TheTimecodesAreThoseOfTheProgrammeSoFar, ())
+{
+    lookAtTimecodes(RandomRecut(*genRecutSeed()));
+    lookAtTimecodes(RandomTimeline(*rc::gen::arbitrary<std::uint64_t>()));
 }
 
 /// The EDLs of the tree.

@@ -31,8 +31,7 @@ std::string transitionText(const EventList& events, std::size_t index, const Eve
 {
     const EventBase& event = events.at(index);
     std::string text = std::to_string(event.transitionType()) + " of " + std::to_string(event.transitionDuration()) +
-                       " at " + std::to_string(std::lround(event.motionSpeed() * 100)) + " % to " +
-                       core::nameBy(rules.matchBy, event) + " from " + event.srcIn().toString();
+                       " to " + core::nameBy(rules.matchBy, event) + " from " + event.srcIn().toString();
     if (index > 0 && events.at(index - 1).eventNumber() == event.eventNumber())
         text += " out of " + core::nameBy(rules.matchBy, events.at(index - 1)) + " at " +
                 events.at(index - 1).srcOut().toString();
@@ -58,12 +57,15 @@ SeenFrame frameOf(const EventList& events, std::size_t index, const EventBase* b
                     event.srcOut().toString() + std::to_string(event.transitionType()) + "/" +
                     std::to_string(event.transitionDuration()) + name,
                 static_cast<double>(frame)};
+    const bool isStill = isFrozen(event, rules);
+    const double speed = isStill || event.isNormalSpeed() ? 1.0 : event.motionSpeed();
+    const int length = event.dstOut().toFrameCount(rules.framerate) - event.dstIn().toFrameCount(rules.framerate);
     if (event.isTransition() && frame < event.transitionDuration())
-        return {transitionText(events, index, before, rules), static_cast<double>(frame)};
-    if (isFrozen(event, rules))
+        return {transitionText(events, index, before, rules) + (isStill ? " frozen" : ""), frame * speed, speed, length,
+                frame};
+    if (isStill)
         return {name + " frozen at " + event.srcIn().toString(), static_cast<double>(frame)};
-    const double speed = event.isNormalSpeed() ? 1.0 : event.motionSpeed();
-    return {name, event.srcIn().toFrameCount(rules.framerate) + frame * speed, speed};
+    return {name, event.srcIn().toFrameCount(rules.framerate) + frame * speed, speed, length, frame};
 }
 
 } // namespace
@@ -75,8 +77,15 @@ bool SeenFrame::looksLike(const SeenFrame& other) const
     if (speed == 1.0 && other.speed == 1.0)
         return source == other.source;
     constexpr double LongestShot = 2000;
-    return std::abs(speed - other.speed) < 0.01 &&
-           std::abs(source - other.source) <= std::abs(speed) + std::abs(speed - other.speed) * LongestShot;
+    const double apart = std::abs(speed - other.speed);
+    if (apart < 0.01)
+        return std::abs(source - other.source) <= std::abs(speed) + apart * LongestShot;
+    const double common = shotLength < other.shotLength ? other.speed : speed;
+    const auto sourceAt = [common](const SeenFrame& frame) {
+        return frame.source + frame.shotFrame * (common - frame.speed);
+    };
+    return apart * std::min(shotLength, other.shotLength) < 1.0 - 1e-6 &&
+           std::abs(sourceAt(*this) - sourceAt(other)) <= common + 1.0;
 }
 
 std::vector<SeenReel> framesOf(const EventList& events, const PictureRules& rules)
@@ -139,6 +148,38 @@ NotesPlayer::NotesPlayer(const EventList& oldCut, const EventList& newCut, const
 
 void NotesPlayer::carryOut(const NoteStep& step)
 {
+    carryOutAlone(step);
+    if (const std::string wrong = overlap(); !wrong.empty())
+        throw std::logic_error(wrong);
+}
+
+/// Which reels lie on each other; empty for none.
+std::string NotesPlayer::overlap() const
+{
+    std::map<int, std::size_t> byStart;
+    for (std::size_t index = 0; index < m_reels.size(); ++index) {
+        if (!m_reels[index].frames.empty() && !byStart.emplace(m_reels[index].start, index).second)
+            return "two reels begin at " + std::to_string(m_reels[index].start);
+    }
+    const SeenReel* before = nullptr;
+    for (const auto& [start, index] : byStart) {
+        if (before != nullptr && before->start + static_cast<int>(before->frames.size()) > start)
+            return "the reel at " + std::to_string(before->start) + " lies on that at " + std::to_string(start);
+        before = &m_reels[index];
+    }
+    return {};
+}
+
+int NotesPlayer::timecodeAt(const core::WorkPlace& place) const
+{
+    const SeenReel& reel = m_reels.at(place.reel);
+    return (reel.frames.empty() ? place.reelStart : reel.start) + place.frame;
+}
+
+void NotesPlayer::carryOutAlone(const NoteStep& step)
+{
+    if (step.action != StepAction::MoveReel && m_reels.at(step.place.reel).frames.empty())
+        m_reels.at(step.place.reel).start = step.place.reelStart;
     auto& reel = m_reels.at(step.place.reel).frames;
     const auto check = [](bool isPossible) {
         if (!isPossible)
@@ -170,8 +211,10 @@ void NotesPlayer::carryOut(const NoteStep& step)
         insert(step.place.frame, fromNewCut);
         break;
     case StepAction::MoveReel:
-        check(step.place.frame == 0 && step.changes.front().frames != 0);
+        check(step.place.frame == 0 && step.changes.front().frames != 0 &&
+              step.from.timecode() == m_reels.at(step.from.reel).start);
         m_reels.at(step.place.reel).start += step.changes.front().frames;
+        check(step.place.timecode() == m_reels.at(step.place.reel).start);
         break;
     }
 }
@@ -182,7 +225,7 @@ std::string NotesPlayer::difference() const
         const std::string where = "reel " + std::to_string(index);
         const auto& [start, frames] = m_reels[index];
         const auto& [goalStart, goal] = m_goal[index];
-        if (start != goalStart)
+        if (start != goalStart && !goal.empty())
             return where + " begins at " + std::to_string(start) + " and not " + std::to_string(goalStart);
         if (frames.size() != goal.size())
             return where + " has " + std::to_string(frames.size()) + " frames and not " + std::to_string(goal.size());
@@ -201,7 +244,7 @@ bool NotesPlayer::isDoneBefore(const core::WorkPlace& place) const
     const auto& [start, frames] = m_reels.at(place.reel);
     const auto& [goalStart, goal] = m_goal.at(place.reel);
     const auto count = static_cast<std::size_t>(place.frame);
-    return start == goalStart && count <= frames.size() && count <= goal.size() &&
+    return (start == goalStart || goal.empty()) && count <= frames.size() && count <= goal.size() &&
            std::equal(frames.begin(), frames.begin() + place.frame, goal.begin(),
                       [](const SeenFrame& a, const SeenFrame& b) { return a.looksLike(b); });
 }

@@ -240,6 +240,102 @@ RandomRecut::RandomRecut(const RecutSeed& seed)
     newCut = listOf(shots, FirstHour + (below(setting, 3) == 0 ? below(setting, 2 * Most) - Most : 0));
 }
 
+namespace {
+
+using ReelOfShots = std::vector<Shot>;
+
+int lengthOf(const ReelOfShots& reel)
+{
+    int length = 0;
+    for (const Shot& shot : reel)
+        length += shot.length;
+    return length;
+}
+
+/// Each some seconds more than a minute after the end of the one before.
+EventList timelineOf(const std::vector<ReelOfShots>& reels, int start, Random& random)
+{
+    EventList events;
+    for (const ReelOfShots& reel : reels) {
+        if (reel.empty())
+            continue;
+        events.append(listOf(reel, start));
+        start += lengthOf(reel) + 1500 + below(random, 1500);
+    }
+    return events;
+}
+
+Shot longShot(Random& random, int number)
+{
+    Shot shot;
+    shot.roll = std::string("L").append(std::to_string(number));
+    shot.srcIn = 1000;
+    shot.length = 100 + below(random, 1500);
+    shot.srcLength = shot.length;
+    return shot;
+}
+
+/// One change to whole shots or to whole reels.
+void changeTimeline(std::vector<ReelOfShots>& reels, Random& random, int number)
+{
+    ReelOfShots& reel = reels[static_cast<std::size_t>(below(random, static_cast<int>(reels.size())))];
+    ReelOfShots& other = reels[static_cast<std::size_t>(below(random, static_cast<int>(reels.size())))];
+    const auto placeIn = [&random](const ReelOfShots& shots) {
+        return below(random, static_cast<int>(shots.size()) + 1);
+    };
+    switch (below(random, 10)) {
+    case 0:
+        std::swap(reel, other);
+        break;
+    case 1:
+        if (below(random, 4) == 0)
+            reel.clear();
+        break;
+    case 2:
+        if (below(random, 2) == 0)
+            reels.insert(reels.begin() + below(random, static_cast<int>(reels.size())), {longShot(random, number)});
+        break;
+    case 3:
+    case 4:
+        reel.insert(reel.begin() + placeIn(reel), longShot(random, number));
+        break;
+    case 5:
+    case 6:
+        if (!reel.empty())
+            reel.erase(reel.begin() + below(random, static_cast<int>(reel.size())));
+        break;
+    default:
+        if (!reel.empty()) {
+            const int place = below(random, static_cast<int>(reel.size()));
+            const Shot moved = reel[static_cast<std::size_t>(place)];
+            reel.erase(reel.begin() + place);
+            other.insert(other.begin() + placeIn(other), moved);
+        }
+        break;
+    }
+}
+
+} // namespace
+
+RandomTimeline::RandomTimeline(std::uint64_t seed)
+{
+    Random random(seed);
+    rules.framerate = Framerate(25, 0);
+    const TestProject project(rules.framerate);
+    int number = 0;
+    std::vector<ReelOfShots> reels(static_cast<std::size_t>(2 + below(random, 3)));
+    for (ReelOfShots& reel : reels) {
+        for (int shot = 0; shot < 5; ++shot)
+            reel.push_back(longShot(random, ++number));
+    }
+    oldCut = timelineOf(reels, FirstHour, random);
+    const int changes = below(random, 8);
+    for (int count = 0; count < changes; ++count)
+        changeTimeline(reels, random, ++number);
+    const int shift = below(random, 2) == 0 ? 0 : below(random, 20000) - 10000;
+    newCut = timelineOf(reels, FirstHour + shift, random);
+}
+
 EventList recutOf(const EventList& events, const Framerate& framerate, std::uint64_t seed)
 {
     std::vector<Shot> shots;

@@ -34,6 +34,17 @@ struct RandomRecut {
     core::EventList newCut;
 };
 
+/// A film of two to four reels on one timeline, one or two minutes apart, which is long enough that its reels can come to lie on
+/// each other; and a new cut in which whole shots have come, gone and moved, also between reels, and in which reels begin
+/// elsewhere, have changed places, are gone or are new.
+struct RandomTimeline {
+    explicit RandomTimeline(std::uint64_t seed);
+
+    core::PictureRules rules;
+    core::EventList oldCut;
+    core::EventList newCut;
+};
+
 /// A list after some changes of that kind.
 core::EventList recutOf(const core::EventList& events, const core::Framerate& framerate, std::uint64_t seed);
 

@@ -3,7 +3,6 @@
 #pragma once
 
 #include "desktop/document/OpenDocuments.h"
-#include "desktop/document/RecentFiles.h"
 #include "standin/Application.h"
 #include "standin/edit/EditService.h"
 #include "standin/edit/ProjectManager.h"
@@ -72,14 +71,15 @@ private:
 };
 
 /// The desktop program without windows: an application with a module, its documents, and a folder for their files.
-class DocumentHost : public testing::Test {
-protected:
+struct DocumentHost {
     using State = SaveAnswer::State;
     using Clock = OpenDocument::Clock;
     using Work = OpenDocuments::Work;
 
     DocumentHost() { application.projects().addNotification(module.get()); }
-    ~DocumentHost() override
+    DocumentHost(const DocumentHost&) = delete;
+    DocumentHost& operator=(const DocumentHost&) = delete;
+    ~DocumentHost()
     {
         while (documents.size() > 0)
             documents.close(documents.at(0));
@@ -125,9 +125,10 @@ protected:
     TempFolder folder;
     standin::Application application;
     Velmark::Counted<StoringModule> module = Velmark::makeCounted<StoringModule>();
-    RecentFiles recent{folder / "state" / "recent.json"};
-    OpenDocuments documents{application, &recent};
+    OpenDocuments documents{application};
     Clock::time_point now = Clock::now();
 };
+
+class DocumentTest : public testing::Test, protected DocumentHost {};
 
 } // namespace desktop::tests

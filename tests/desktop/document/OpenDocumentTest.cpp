@@ -18,7 +18,7 @@ namespace fs = std::filesystem;
 using cadrel::tests::FileSizeLimit;
 using cadrel::tests::NoPrivileges;
 
-class OpenDocumentTest : public DocumentHost {
+class OpenDocumentTest : public DocumentTest {
 protected:
     OpenDocument& opened() { return documents.open(file); }
 

@@ -2,12 +2,14 @@
 
 #include "host/project/PreviewRecord.h"
 
+#include "core/serialize/ByteArchive.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NumberList.h"
 #include "host/project/EventPrint.h"
 #include "standin/project/ClipEvent.h"
 #include "tests/support/host/TrackHost.h"
 #include "velmark/Attributes.h"
+#include "velmark/Automation.h"
 #include "velmark/String.h"
 
 #include <gtest/gtest.h>
@@ -16,6 +18,7 @@
 #include <functional>
 #include <limits>
 #include <string>
+#include <utility>
 #include <vector>
 
 using namespace Velmark;
@@ -25,8 +28,19 @@ namespace cadrel::host {
 using tests::TrackHost;
 using Names = std::vector<std::string>;
 using Numbers = std::vector<double>;
+/// Their times and values.
+using Points = std::vector<std::pair<double, float>>;
+using Curve = standin::Envelope::Curve;
 
 namespace {
+
+double checksum(const Numbers& numbers)
+{
+    core::serialize::ByteArchive bytes;
+    for (const double number : numbers)
+        bytes << number;
+    return static_cast<double>(bytes.crc32() >> 3);
+}
 
 /// A track with two clips that were there before, and with what was written from 100 s on.
 class PreviewRecordTest : public testing::Test {
@@ -55,6 +69,14 @@ protected:
     void store(const char* key, const Numbers& numbers) { writeNumbers(host.context(), *node, key, numbers); }
     Numbers stored(const char* key) { return readNumbers(*node, key).value_or(Numbers()); }
 
+    /// One of an earlier project, of 100 s to 130 s without events.
+    void storeEarlier()
+    {
+        Numbers head{100.0, 2.0, 25.0, 0.0, 130.0, checksum({})};
+        head.push_back(checksum(head));
+        store(head);
+    }
+
     TrackHost::Node child(std::size_t index) { return standin::tests::childrenOf(*node)[index]; }
     Names othersOf(const PreviewRecord& written)
     {
@@ -62,6 +84,18 @@ protected:
         for (const auto& event : written.others(eventsReachingInto(track, 100.0, 1000.0)))
             names.push_back(ConstString(event->getName()).text8());
         return names;
+    }
+
+    /// Those of the points from 100 s on that aren't in the record.
+    Points otherPoints(int32 number)
+    {
+        const TrackHost::Node curve = host.curveOf(node, number);
+        std::vector<TrackHost::Node> points = standin::tests::childrenOf(*curve);
+        std::erase_if(points, [](const TrackHost::Node& point) { return point->getStart(nullptr) < 100.0; });
+        Points others;
+        for (const auto& point : kept()->automation().others(*curve, points))
+            others.emplace_back(point->getStart(nullptr), query<IAutomationPoint>(point)->getValue());
+        return others;
     }
 
     TrackHost host{0.0};
@@ -94,57 +128,92 @@ TEST_F(PreviewRecordTest, KnowsNoEndWhereNothingWasWritten)
 
 TEST_F(PreviewRecordTest, ReachesToTheLastPointOfItsAutomation)
 {
-    constexpr int32 volume = standin::Envelope::Curve::Volume;
-    host.addPoint(node, volume, 99.0, 0.5F);
+    host.addPoint(node, Curve::Volume, 99.0, 0.5F);
     EXPECT_FALSE(record().end());
 
-    host.addPoint(node, volume, 100.0, 0.5F);
+    host.addPoint(node, Curve::Volume, 100.0, 0.5F);
     EXPECT_EQ(record().end(), 100.0);
-    host.addPoint(node, volume, 140.0, 0.5F);
+    host.addPoint(node, Curve::Volume, 140.0, 0.5F);
     addCopies();
     keep(record());
 
     EXPECT_EQ(kept()->end(), 140.0);
 }
 
-TEST_F(PreviewRecordTest, KnowsTheCurvesOnWhichSomethingWasWritten)
+TEST_F(PreviewRecordTest, TellsPointsThatWereDrawnMovedOrGivenAnotherValueFromThoseThatWereWritten)
 {
-    using Curve = standin::Envelope::Curve;
-    host.addPoint(node, Curve::Volume, 100.0, 0.5F);
-    host.addPoint(node, Curve::Pan, 99.0, 0.5F);
+    host.addPoint(node, Curve::Volume, 99.0, 0.5F);
+    const auto moved = host.addPoint(node, Curve::Volume, 100.0, 0.5F);
+    host.addPoint(node, Curve::Volume, 105.0, 0.1F);
+    const auto changed = host.addPoint(node, Curve::Volume, 110.0, 0.25F);
+    host.addPoint(node, Curve::Pan, 120.0, 0.75F);
     keep(record());
-    host.addPoint(node, Curve::Mute, 105.0, 0.5F);
+    EXPECT_EQ(otherPoints(Curve::Volume), Points{});
+    EXPECT_EQ(otherPoints(Curve::Pan), Points{});
 
-    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Volume));
-    EXPECT_FALSE(kept()->hasWrittenOn(Curve::Pan));
-    EXPECT_FALSE(kept()->hasWrittenOn(Curve::Mute));
+    requireOk(moved->setStart(nullptr, 0, 100.04));
+    requireOk(query<IAutomationPoint>(changed)->setValue(0.2501F));
+    host.addPoint(node, Curve::Volume, 120.0, 0.75F);
+    host.addPoint(node, Curve::Pan, 120.5, 0.75F);
+    host.addPoint(node, Curve::Mute, 120.0, 0.75F);
+
+    EXPECT_EQ(otherPoints(Curve::Volume), (Points{{100.04, 0.5F}, {110.0, 0.2501F}, {120.0, 0.75F}}));
+    EXPECT_EQ(otherPoints(Curve::Pan), (Points{{120.5, 0.75F}}));
+    EXPECT_EQ(otherPoints(Curve::Mute), (Points{{120.0, 0.75F}}));
 }
 
-TEST_F(PreviewRecordTest, MayHaveWrittenOnEachCurveWhereThatIsNotKnown)
+TEST_F(PreviewRecordTest, TellsAPointThatTheUserHasSetAtOneThatWasWritten)
 {
-    using Curve = standin::Envelope::Curve;
-    host.addPoint(node, Curve::Volume, 100.0, 0.5F);
+    for (const float value : {0.25F, 0.75F})
+        host.addPoint(node, Curve::Volume, 100.0, value);
     keep(record());
-    const Numbers whole = stored(AttributeKey::PreviewCurves);
-    ASSERT_EQ(whole.size(), 2U);
-    ASSERT_FALSE(kept()->hasWrittenOn(Curve::Pan));
 
-    for (std::size_t index = 0; index < whole.size(); ++index) {
-        Numbers damaged = whole;
-        damaged[index] += 1.0;
-        store(AttributeKey::PreviewCurves, damaged);
-        ASSERT_TRUE(kept());
-        EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan)) << index;
+    for (const float value : {0.75F, 0.5F})
+        host.addPoint(node, Curve::Volume, 100.0, value);
+
+    EXPECT_EQ(otherPoints(Curve::Volume), (Points{{100.0, 0.75F}, {100.0, 0.5F}}));
+}
+
+TEST_F(PreviewRecordTest, ReadsThoseOfEarlierProjectsWhichKnowCurvesButNoPoints)
+{
+    for (const int32 curve : {Curve::Volume, Curve::Pan}) {
+        for (const double time : {100.0, 130.0, 130.01})
+            host.addPoint(node, curve, time, 0.5F);
     }
-    store(AttributeKey::PreviewCurves, {whole[0]});
-    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan));
+    storeEarlier();
+    // Whatever stands on the volume up to the end of what was written, as nobody knows what was drawn.
+    store(AttributeKey::PreviewCurves, {checksum({100.0, 1.0}), 1.0});
+    EXPECT_EQ(otherPoints(Curve::Volume), (Points{{130.01, 0.5F}}));
+    EXPECT_EQ(otherPoints(Curve::Pan), (Points{{100.0, 0.5F}, {130.0, 0.5F}, {130.01, 0.5F}}));
+    store(AttributeKey::PreviewCurves, {checksum({100.0})});
+    EXPECT_EQ(otherPoints(Curve::Volume).size(), 3U);
+
+    // Whatever stands there at all.
     removeNumbers(*node, AttributeKey::PreviewCurves);
-    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan));
-    // A copy of it without them doesn't know them either.
-    const PreviewRecord without = *kept();
+    EXPECT_EQ(otherPoints(Curve::Volume), (Points{{130.01, 0.5F}}));
+    EXPECT_EQ(otherPoints(Curve::Pan), (Points{{130.01, 0.5F}}));
+    for (const Numbers& numbers : {Numbers{100.0, 130.0}, Numbers{100.0, 1.0, 25.0, 0.0, 130.0}}) {
+        store(numbers);
+        EXPECT_EQ(otherPoints(Curve::Pan), (Points{{130.01, 0.5F}}));
+    }
+}
+
+TEST_F(PreviewRecordTest, OfEarlierProjectsIsNoneWhereItsCurvesAreDamaged)
+{
+    storeEarlier();
+    const Numbers whole{checksum({100.0, 1.0}), 1.0};
     store(AttributeKey::PreviewCurves, whole);
-    keep(without);
-    EXPECT_TRUE(kept()->hasWrittenOn(Curve::Pan));
+    ASSERT_TRUE(kept());
+
+    for (const Numbers& damaged : {Numbers{whole[0] + 1.0, 1.0}, Numbers{whole[0], 2.0}, Numbers{whole[0]}, Numbers{},
+                                   Numbers{checksum({101.0, 1.0}), 1.0}}) {
+        SCOPED_TRACE(testing::PrintToString(damaged));
+        store(AttributeKey::PreviewCurves, damaged);
+        EXPECT_FALSE(kept());
+        EXPECT_TRUE(PreviewRecord::headKeptBy(track));
+    }
+    node->setAttribute(AttributeKey::PreviewCurves, FVariant::integer(1), true);
+    EXPECT_FALSE(kept());
 }
 
 TEST_F(PreviewRecordTest, KeepsTheFrameRate)
@@ -295,21 +364,28 @@ TEST_F(PreviewRecordTest, ItsHeadIsReadWithoutItsEvents)
     PreviewRecord::dropFrom(track);
     EXPECT_FALSE(PreviewRecord::headKeptBy(track));
     EXPECT_EQ(node->hasAttribute(AttributeKey::PreviewEvents), ResultFalse);
+    EXPECT_EQ(node->hasAttribute(AttributeKey::PreviewCurves), ResultFalse);
 }
 
 TEST_F(PreviewRecordTest, IsNoneOnceAnyNumberIsDamaged)
 {
     addCopies();
+    host.addPoint(node, Curve::Volume, 100.0, 0.5F);
+    host.addPoint(node, Curve::Pan, 110.0, 0.25F);
     keep(record());
-    for (const char* const key : {AttributeKey::Preview, AttributeKey::PreviewEvents}) {
+    EXPECT_EQ(stored(AttributeKey::PreviewCurves), (Numbers{1.0, 100.0, 0.5, 2.0, 110.0, 0.25}));
+    const std::vector<std::pair<const char*, std::size_t>> attributes{
+        {AttributeKey::Preview, 7}, {AttributeKey::PreviewEvents, 8}, {AttributeKey::PreviewCurves, 6}};
+    for (const auto& [key, size] : attributes) {
         SCOPED_TRACE(key);
         const Numbers numbers = stored(key);
-        ASSERT_EQ(numbers.size(), key == AttributeKey::Preview ? 7U : 8U);
-        const auto expectNone = [&](const Numbers& damaged) {
+        ASSERT_EQ(numbers.size(), size);
+        const bool isHead = key == AttributeKey::Preview;
+        const auto expectNone = [&, &stored = key](const Numbers& damaged) {
             SCOPED_TRACE(testing::PrintToString(damaged));
-            store(key, damaged);
+            store(stored, damaged);
             EXPECT_FALSE(kept());
-            EXPECT_EQ(PreviewRecord::headKeptBy(track).has_value(), key != AttributeKey::Preview);
+            EXPECT_EQ(PreviewRecord::headKeptBy(track).has_value(), !isHead);
         };
         for (std::size_t index = 0; index < numbers.size(); ++index) {
             for (const double wrong : {numbers[index] + 1.0, 1e9, -1.0, std::numeric_limits<double>::quiet_NaN()}) {
@@ -325,8 +401,13 @@ TEST_F(PreviewRecordTest, IsNoneOnceAnyNumberIsDamaged)
         store(key, numbers);
         EXPECT_TRUE(kept());
     }
-    node->removeAttribute(AttributeKey::PreviewEvents);
-    EXPECT_FALSE(kept());
+    for (const char* const key : {AttributeKey::PreviewEvents, AttributeKey::PreviewCurves}) {
+        const Numbers numbers = stored(key);
+        node->removeAttribute(key);
+        EXPECT_FALSE(kept());
+        store(key, numbers);
+        EXPECT_TRUE(kept());
+    }
 }
 
 TEST_F(PreviewRecordTest, AnEndBeforeThatOfItsEventsIsTheirs)
@@ -365,7 +446,8 @@ TEST_F(PreviewRecordTest, IsNoneWhereTheNumbersMakeNoSense)
     EXPECT_FALSE(PreviewRecord::isKeptBy(track));
     for (const Numbers& numbers :
          {Numbers{}, Numbers{1e9 + 1.0}, Numbers{-1e9 - 1.0}, Numbers{100.0, 99.0}, Numbers{100.0, 1.0, 25.0},
-          Numbers{100.0, 2.0, 25.0, 0.0, 130.0}, Numbers{100.0, 1.0, 25.0, 0.0, 130.0, 100.0, 130.0},
+          Numbers{100.0, 2.0, 25.0, 0.0, 130.0}, Numbers{100.0, 3.0, 25.0, 0.0, 130.0},
+          Numbers{100.0, 1.0, 25.0, 0.0, 130.0, 100.0, 130.0},
           Numbers{100.0, 1.0, 25.0, 0.0, 99.0, 100.0, 110.0, 0.0, 7.0}}) {
         SCOPED_TRACE(testing::PrintToString(numbers));
         store(numbers);

@@ -9,6 +9,7 @@
 #include "tests/support/host/AlteredContext.h"
 #include "tests/support/host/FakeProject.h"
 #include "tests/support/host/TrackHost.h"
+#include "tests/support/host/UnmarkedPoint.h"
 #include "velmark/Automation.h"
 #include "velmark/ClassId.h"
 
@@ -32,6 +33,7 @@ using tests::AlteredContext;
 using tests::FakeNode;
 using tests::FakeProject;
 using tests::TrackHost;
+using tests::UnmarkedPoint;
 using util::Result;
 
 namespace {
@@ -355,6 +357,23 @@ TEST_P(AutomationCurveTest, WhatTheUserHasSetStaysAlsoWhereTheCurveRunsTheSameWi
     setAll(0.5F);
     drop();
     EXPECT_EQ(host.points(Volume), (Points{{0.0, 0.5F}, {5.0, 0.5F}}));
+}
+
+TEST_P(AutomationCurveTest, RunsTheSameWhereTheHostsPointsTakeNoMarks)
+{
+    host.set(Volume, {{0.0, 0.0F}, {40.0, 1.0F}});
+    AlteredContext context(host.context());
+    context.makeInstead(ClassId::AutomationPoint, [] { return makeCounted<UnmarkedPoint>(); });
+
+    host.change(Volume, [&](AutomationCurve& curve) {
+        curve.hold(&context, *host.transaction(), clock(10.0), clock(20.0));
+        curve.fill(&context, *host.transaction(), clock(30.0), clock(35.0));
+        curve.dropNeedless(*host.transaction(), clock(0.0), clock(40.0));
+    });
+
+    EXPECT_EQ(
+        host.points(Volume),
+        (Points{{0.0, 0.0F}, {10.0, 0.25F}, {20.0, 0.25F}, {20.0, 0.5F}, {30.0, 0.75F}, {35.0, 0.875F}, {40.0, 1.0F}}));
 }
 
 TEST_P(AutomationCurveTest, FilledGapsAreUndoneWithTheirTransaction)

@@ -148,6 +148,15 @@ TEST(ArdourForm, ReadsRegionsThatStandAtBeats)
     EXPECT_EQ(eventAt(session.track("Dia"), 0).end(), 1.5);
 }
 
+TEST(ArdourForm, ReadsALengthInBeatsDownToTheSample)
+{
+    // A tick lasts 12.5 samples, so that what begins at 12.5 and ends at 25 begins at 12 and is 12 long.
+    const SessionProject session(
+        SessionText{.regions = R"(<Region name="r" start="a0" length="b1@b1" id="51" type="audio" source-0="11"/>)"});
+    EXPECT_DOUBLE_EQ(eventAt(session.track("Dia"), 0).start(), 12.0 / 48000);
+    EXPECT_DOUBLE_EQ(eventAt(session.track("Dia"), 0).end(), 24.0 / 48000);
+}
+
 TEST(ArdourForm, ReadsSessionsOfVersion6000)
 {
     const SessionProject session(SessionText{
@@ -210,7 +219,7 @@ TEST(ArdourForm, ReadsAndWritesAVcaAsABus)
     text.insert(text.find("  <Playlists>"), vca);
     const SessionProject session(text);
     EXPECT_EQ(session.text(), text);
-    Envelope& curve = *session.track("VCA 1").curves().rbegin()->second;
+    Envelope& curve = session.track("VCA 1").curve(Envelope::Curve::Volume);
     ASSERT_EQ(curve.childCount(), 2U);
     curve.lastChild()->setSpan(2.0, 2.0);
     EXPECT_TRUE(contains(session.text(), "a0 1\na564480000 0.5\n"));
@@ -265,6 +274,49 @@ TEST(ArdourForm, ReadsMarksAndRangesAsMarkers)
     EXPECT_EQ(session.project->cycleRight().getValue(), 2.0);
 }
 
+TEST(ArdourForm, ReadsTheVideoOfTheTimelineAsTheOldPicture)
+{
+    const auto videoAt = [](const std::string& attributes) {
+        return SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange"),
+                           .extra = "<Extra><Videotimeline " + attributes + "/></Extra>"};
+    };
+    const SessionProject session(videoAt(R"(Filename="reel.mov" LocalFile="1" VideoOffset="96000")"));
+    const Track& track = session.track("Video");
+    EXPECT_EQ(track.kind(), Track::Kind::Video);
+    EXPECT_TRUE(track.isLocked());
+    const auto& later = static_cast<const ClipEvent&>(*track.firstChild());
+    EXPECT_EQ(later.clip()->path(), u"/film/videofiles/reel.mov");
+    EXPECT_EQ(later.start(), 2.0);
+    EXPECT_EQ(later.end(), 10.0);
+    EXPECT_EQ(later.sourceOffset(), 0.0);
+    EXPECT_EQ(session.project->form()->staying(), std::vector<std::string>{"the video \"reel.mov\""});
+
+    const SessionProject before(videoAt(R"(Filename="/pix/reel.mov" VideoOffset="-48000")"));
+    const auto& sooner = static_cast<const ClipEvent&>(*before.track("Video").firstChild());
+    EXPECT_EQ(sooner.clip()->path(), u"/pix/reel.mov");
+    EXPECT_EQ(sooner.start(), 0.0);
+    EXPECT_EQ(sooner.sourceOffset(), 1.0);
+    EXPECT_EQ(sooner.clip()->seconds(), 11.0);
+
+    for (const std::string none : {R"(Height="3")", R"(Filename="")", R"(Filename="a.mov" VideoOffset="480000")"})
+        EXPECT_EQ(SessionProject(videoAt(none)).project->allTracks().size(), 1U) << none;
+    for (const std::string offset : {"x", "--1", "9223372036854775807"})
+        EXPECT_TRUE(contains(faultOf(videoAt("Filename=\"a.mov\" VideoOffset=\"" + offset + "\"")), "Videotimeline"));
+}
+
+TEST(ArdourForm, LeavesTheVideoWhereTheSessionHasIt)
+{
+    const std::string text =
+        SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange"),
+                    .extra = R"(<Extra><Videotimeline Filename="reel.mov" VideoOffset="0"/></Extra>)"};
+    const SessionProject session(text);
+    EXPECT_EQ(session.text(), text);
+    session.project->setAttribute("CaDs", Attribute{Velmark::int64{42}, true});
+    const std::string written = session.text();
+    EXPECT_FALSE(contains(written, "Form:Video"));
+    EXPECT_EQ(SessionProject(written).track("Video").childCount(), 1U);
+}
+
 TEST(ArdourForm, RefusesWhatItCannotRead)
 {
     const auto saysOf = [](const SessionText& text, const std::string& words) {
@@ -303,6 +355,47 @@ TEST(ArdourForm, ReadsTheOldestAndTheNewestVersionThatItKnows)
 {
     EXPECT_EQ(faultOf(SessionText{.version = "7003"}), "none");
     EXPECT_EQ(faultOf(SessionText{.version = "6000"}), "none");
+}
+
+TEST(ArdourForm, RefusesATextThatIsNotUtf8)
+{
+    const auto declared = [](const std::string& encoding) {
+        std::string text = SessionText();
+        text.replace(text.find("UTF-8"), 5, encoding);
+        return text;
+    };
+    EXPECT_EQ(faultOf(declared("utf-8")), "none");
+    EXPECT_EQ(faultOf(declared("US-ASCII")), "none");
+    EXPECT_TRUE(contains(faultOf(declared("ISO-8859-1")), "the file is \"ISO-8859-1\", but Ardour writes UTF-8"));
+    EXPECT_TRUE(contains(faultOf(declared("UTF-16")), "UTF-16"));
+    std::string wide("\xFF\xFE");
+    for (const char letter : std::string(SessionText()))
+        wide.append(1, letter).append(1, '\0');
+    EXPECT_TRUE(contains(faultOf(wide), "UTF-16"));
+    std::string without = SessionText();
+    EXPECT_EQ(faultOf(without.erase(0, without.find("<Session"))), "none");
+}
+
+TEST(ArdourForm, RefusesWhatStandsAfterTheSession)
+{
+    EXPECT_TRUE(contains(faultOf(std::string(SessionText()) + "<Session/>"), "after the end of the session"));
+    EXPECT_EQ(faultOf(std::string(SessionText()) + "<!-- kept -->\n"), "none");
+}
+
+TEST(ArdourForm, TellsWhatToDoAboutASessionThatItRefuses)
+{
+    const auto remedyOf = [](const std::string& text) {
+        try {
+            SessionProject read(text);
+        } catch (const ProjectFileError& error) {
+            return error.remedy();
+        }
+        return std::string("none");
+    };
+    EXPECT_EQ(remedyOf(SessionText{.version = "8000"}), "take a copy that Ardour 7 has saved");
+    EXPECT_EQ(remedyOf(SessionText{.version = "3001"}), "open the session in Ardour 7 and save it there");
+    EXPECT_EQ(remedyOf(SessionText{.sampleRate = "0"}),
+              "open the session in Ardour and save it there, or take an intact copy");
 }
 
 TEST(ArdourForm, RefusesElementsThatLieTooDeep)
@@ -376,6 +469,60 @@ TEST(ArdourForm, LeavesARegionAloneThatPlaysTheSameAtTheSamePlace)
     const std::string text = SessionText{
         .regions = R"(<Region name="r" start="a5881" length="a5881@a5881" id="51" type="audio" source-0="11"/>)"};
     EXPECT_EQ(SessionProject(text).text(), text);
+}
+
+TEST(ArdourForm, SwitchesTheFadesOffWhereALaterRunJoinsWhatAnEarlierOneHasCut)
+{
+    const SessionProject session(SessionText{.regions = region(51, 0, 96000)});
+    Track& track = session.track("Dia");
+    const auto head = eventAt(track, 0).cutOut(0.0, 1.0);
+    const auto tail = eventAt(track, 0).cutOut(1.0, 2.0);
+    eventAt(track, 0).remove();
+    tail->setSpan(6.0, 7.0);
+    head->insertInto(track);
+    tail->insertInto(track);
+    const std::string apart = session.text();
+    const auto fadesIn = [](const std::string& text) {
+        std::string fades;
+        for (const pugi::xml_node& node : Parsed(text).all("//Playlist/Region"))
+            fades.append(node.attribute("fade-in-active").value()).append(node.attribute("fade-out-active").value());
+        return fades;
+    };
+    EXPECT_EQ(fadesIn(apart), "1111");
+    const SessionProject second(apart);
+    EXPECT_EQ(second.text(), apart);
+    eventAt(second.track("Dia"), 1).setSpan(1.0, 2.0);
+    const std::string together = second.text();
+    EXPECT_EQ(fadesIn(together), "1001");
+    // And a third run that pulls them apart again.
+    const SessionProject third(together);
+    EXPECT_EQ(third.text(), together);
+    eventAt(third.track("Dia"), 1).setSpan(3.0, 4.0);
+    EXPECT_EQ(fadesIn(third.text()), "1111");
+}
+
+TEST(ArdourForm, KeepsAFadeThatTheUserHasDrawnWhereAnEarlierRunHadCut)
+{
+    const SessionProject session(SessionText{.regions = region(51, 0, 96000)});
+    Track& track = session.track("Dia");
+    const auto head = eventAt(track, 0).cutOut(0.0, 1.0);
+    const auto tail = eventAt(track, 0).cutOut(1.0, 2.0);
+    eventAt(track, 0).remove();
+    tail->setSpan(6.0, 7.0);
+    head->insertInto(track);
+    tail->insertInto(track);
+    std::string text = session.text();
+    const std::size_t second = text.rfind("default-fade-in=\"1\"");
+    text.replace(second, 19, "default-fade-in=\"0\"");
+    text.insert(text.find('>', second) + 1,
+                "<FadeIn><AutomationList interpolation-style=\"Curved\"><events>a0 0 a58800000 1</events>"
+                "</AutomationList></FadeIn>");
+    const SessionProject again(text);
+    eventAt(again.track("Dia"), 1).setSpan(1.0, 2.0);
+    const Parsed written(again.text());
+    EXPECT_STREQ(written.all("//Playlist/Region").at(0).attribute("fade-out-active").value(), "1");
+    EXPECT_STREQ(written.all("//Playlist/Region").at(1).attribute("fade-in-active").value(), "1");
+    EXPECT_EQ(written.all("//Playlist/Region/FadeIn").size(), 1U);
 }
 
 TEST(ArdourForm, SwitchesTheFadesOffWhereTwoPiecesFollow)
@@ -606,9 +753,30 @@ TEST_F(OwnContent, LeavesAnEmptyExtraElementAndEmptyLocationsWhole)
     EXPECT_EQ(Parsed(written).all("/Session/Extra/Cadrel").size(), 1U);
 }
 
-TEST(ArdourForm, RefusesStoredContentThatIsBroken)
+TEST(ArdourForm, ReadsTheSoundWhereStoredContentIsBrokenAndReplacesThat)
 {
-    EXPECT_NE(faultOf(SessionText{.extra = "<Extra><Cadrel version='1'>{\"format\": 1}</Cadrel></Extra>"}), "none");
+    const SessionProject session(
+        SessionText{.locations = location(64, "Insert: a", 48000, 48000, "IsMark"),
+                    .regions = region(51, 0, 96000),
+                    .extra = "<Extra><Cadrel version='1' markers='64'>{\"format\": 1}</Cadrel></Extra>"});
+    EXPECT_TRUE(session.project->form()->hasBrokenStorage());
+    EXPECT_EQ(session.track("Dia").childCount(), 1U);
+    // What may be the user's stays.
+    EXPECT_EQ(session.track("Markers").childCount(), 1U);
+    session.project->setAttribute("CaDs", Attribute{Velmark::int64{42}, true});
+    const SessionProject again(session.text());
+    EXPECT_FALSE(again.project->form()->hasBrokenStorage());
+    EXPECT_EQ(std::get<Velmark::int64>(again.project->attributes().at("CaDs").value), 42);
+}
+
+TEST_F(OwnContent, HasItsKindInTheNameOnlyOnce)
+{
+    marker->setName(u"insert of a shot ");
+    const std::string text = session.text();
+    EXPECT_STREQ(Parsed(text).all("//Location").at(1).attribute("name").value(), "insert of a shot");
+    const SessionProject again(text);
+    EXPECT_EQ(again.track("Insert").firstChild()->name(), u"insert of a shot ");
+    EXPECT_EQ(again.text(), text);
 }
 
 // ------------------------------------------------------------------------------------------------------------- on disk
@@ -662,6 +830,9 @@ TEST_F(SessionFolder, StandsForItsOnlySession)
     EXPECT_EQ(ProjectFile::fileIn(folder / "reel.ardour"), folder / "reel.ardour");
     EXPECT_EQ(ProjectFile::fileIn(folder / "missing.ardour"), folder / "missing.ardour");
     put("reel.ardour.bak", "<Session/>");
+    EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
+    put("reel_backup_1.ardour", "<Session/>");
+    put("reel_backup_12.ardour", "<Session/>");
     EXPECT_EQ(ProjectFile::fileIn(folder), folder / "reel.ardour");
     put("other.ardour", "<Session/>");
     EXPECT_THROW(ProjectFile::fileIn(folder), ProjectFileError);

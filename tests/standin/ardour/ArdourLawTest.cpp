@@ -26,14 +26,31 @@ namespace {
 constexpr double Frame = 1001.0 / 30000.0;
 constexpr double SampleRate = 48000.0;
 
+/// Fades that a user may have drawn, or none, which don't overlap.
+std::string someFades(int firstId, long length)
+{
+    if (length < 2 || *rc::gen::arbitrary<bool>())
+        return std::string();
+    const auto fade = [&firstId](const std::string& name, long samples, const std::string& from,
+                                 const std::string& to) {
+        return "<" + name + "><AutomationList id=\"" + std::to_string(firstId++) +
+               "\" interpolation-style=\"Curved\"><events>a0 " + from + "\na" + std::to_string(samples * 5880) + " " +
+               to + "</events></AutomationList></" + name + ">";
+    };
+    const long in = *rc::gen::inRange(1L, length);
+    return fade("FadeIn", in, "0", "1") + fade("FadeOut", length - in, "1", "0");
+}
+
 /// A session with regions that may overlap, with automation, marks and ranges, none of them at a frame.
 SessionText someSession()
 {
     SessionText text{.timecode = "timecode_2997"};
     const int count = *rc::gen::inRange(0, 6);
-    for (int id = 0; id < count; ++id)
-        text.regions +=
-            region(100 + id, *rc::gen::inRange(0, 400000), *rc::gen::inRange(1, 200000), *rc::gen::inRange(0, 5000));
+    for (int id = 0; id < count; ++id) {
+        const long length = *rc::gen::inRange(1, 200000);
+        text.regions += region(100 + id, *rc::gen::inRange(0, 400000), length, *rc::gen::inRange(0, 5000),
+                               someFades(300 + 4 * id, length));
+    }
     long time = *rc::gen::inRange(0, 1000);
     std::string points;
     std::string steps;
@@ -219,6 +236,46 @@ RC_GTEST_PROP(ArdourLaw, WhatIsWrittenHoldsTheValuesThatTheProjectHolds, ())
     }
 }
 
+RC_GTEST_PROP(ArdourLaw, NoFadesOfARegionOverlap, ())
+{
+    SessionText text = someSession();
+    for (std::size_t at = 0; (at = text.regions.find("default-fade-", at)) != std::string::npos; at += 20)
+        text.regions[text.regions.find('"', at) + 1] = '0';
+    EditedSession session(text);
+    session.edit();
+    pugi::xml_document document;
+    RC_ASSERT(static_cast<bool>(document.load_string(session.text().c_str())));
+    const auto samplesOf = [](const std::string& time) { return std::stol(time.substr(1)) / 5880; };
+    const auto lengthOf = [&](const pugi::xml_node& node) { return samplesOf(node.attribute("length").value()); };
+    pugi::xml_document former;
+    RC_ASSERT(static_cast<bool>(former.load_string(std::string(text).c_str())));
+    std::map<std::string, long> whole;
+    for (const pugi::xpath_node& found : former.select_nodes("//Playlist/Region"))
+        whole[found.node().attribute("name").value()] = lengthOf(found.node());
+    for (const pugi::xpath_node& found : document.select_nodes("//Playlist/Region")) {
+        const pugi::xml_node node = found.node();
+        const long length = lengthOf(node);
+        // One that was moved whole has the fades that the user has given it.
+        if (length == whole.at(node.attribute("name").value()))
+            continue;
+        const auto fadeOf = [&](const char* active, const char* isDefault, const char* name) {
+            if (node.attribute(active).as_int() == 0)
+                return 0L;
+            const std::string events = node.child(name).child("AutomationList").child("events").text().get();
+            if (node.attribute(isDefault).as_int() == 1 || events.empty())
+                return 64L;
+            std::istringstream words(events);
+            std::string last;
+            for (std::string time, value; words >> time >> value;)
+                last = time;
+            return samplesOf(last);
+        };
+        RC_ASSERT(fadeOf("fade-in-active", "default-fade-in", "FadeIn") +
+                      fadeOf("fade-out-active", "default-fade-out", "FadeOut") <=
+                  length);
+    }
+}
+
 RC_GTEST_PROP(ArdourLaw, IdsStayUniqueAndReferencesWhole, ())
 {
     EditedSession session(someSession());
@@ -226,14 +283,15 @@ RC_GTEST_PROP(ArdourLaw, IdsStayUniqueAndReferencesWhole, ())
     pugi::xml_document document;
     RC_ASSERT(static_cast<bool>(document.load_string(session.text().c_str())));
     std::set<std::string> sources;
-    for (const pugi::xpath_node& source : document.select_nodes("//Source"))
+    for (const pugi::xpath_node& source : document.select_nodes("//Sources/Source"))
         sources.insert(source.node().attribute("id").value());
     const long long counter = document.document_element().attribute("id-counter").as_llong();
     std::set<std::string> ids;
-    for (const pugi::xpath_node& node : document.select_nodes("//Playlist/Region | //Location")) {
+    for (const pugi::xpath_node& node :
+         document.select_nodes("//Playlist/Region | //Playlist//AutomationList | //Location")) {
         RC_ASSERT(ids.insert(node.node().attribute("id").value()).second);
         RC_ASSERT(node.node().attribute("id").as_llong() < counter);
-        RC_ASSERT(std::string(node.node().name()) == "Location" ||
+        RC_ASSERT(std::string(node.node().name()) != "Region" ||
                   sources.contains(node.node().attribute("source-0").value()));
     }
 }

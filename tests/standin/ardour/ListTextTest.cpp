@@ -87,6 +87,16 @@ TEST_F(ListText, HasNothingBeforeTheBeginning)
     EXPECT_EQ(written({{0.0, 1.0}, {0.0, 2.0}}), "a0 2\n");
 }
 
+TEST_F(ListText, StepsOverASampleWhereTheSessionCountsSamples)
+{
+    pugi::xml_document session;
+    session.load_string(R"(<Session version="6000" sample-rate="48000"/>)");
+    clock = SessionClock(session.document_element());
+    EXPECT_EQ(written({{0.0, 2.0}, {1.0, 1.0}, {1.0, 3.0}}), "0 2\n47999 1\n48000 3\n");
+    // There is no room before the sample where another point stands there already.
+    EXPECT_EQ(written({{0.0, 2.0}, {1.0 / 48000, 1.0}, {1.0 / 48000, 3.0}}), "0 2\n1 3\n");
+}
+
 TEST_F(ListText, LosesItsEventsWithItsPoints)
 {
     pugi::xml_node node = list("a0 1");

@@ -2,6 +2,8 @@
 
 #include "standin/ardour/RegionPiece.h"
 
+#include "standin/ardour/FadeCurve.h"
+
 #include "standin/project/ClipEvent.h"
 
 #include <gtest/gtest.h>
@@ -63,13 +65,72 @@ TEST(RegionPiece, HasASeamWhereItsOtherHalfFollows)
     const auto head = eventOf(Whole, clock, 1000 / 48000.0, 4000 / 48000.0, 1.0);
     const auto tail = eventOf(Whole, clock, 4000 / 48000.0, 11000 / 48000.0, 1.0);
     const auto other = eventOf(Whole, clock, 4000 / 48000.0, 11000 / 48000.0, 5.0);
-    auto pieces = piecesOf(Whole, {head.get(), tail.get()}, clock);
-    ASSERT_EQ(pieces.size(), 2U);
-    EXPECT_EQ(pieces[0].tail, RegionEdge::Seam);
-    EXPECT_EQ(pieces[1].head, RegionEdge::Seam);
-    pieces = piecesOf(Whole, {head.get(), other.get()}, clock);
-    EXPECT_EQ(pieces[0].tail, RegionEdge::New);
-    EXPECT_EQ(pieces[1].head, RegionEdge::New);
+    const auto edgesOf = [&](const std::vector<const ClipEvent*>& events) {
+        std::vector<RegionPieces> playlist{{Whole, piecesOf(Whole, events, clock)}};
+        findSeams(playlist);
+        const auto& pieces = playlist.front().pieces;
+        return std::vector{pieces.at(0).head, pieces.at(0).tail, pieces.at(1).head, pieces.at(1).tail};
+    };
+    using enum RegionEdge;
+    EXPECT_EQ(edgesOf({head.get(), tail.get()}), (std::vector{Old, Seam, Seam, Old}));
+    EXPECT_EQ(edgesOf({head.get(), other.get()}), (std::vector{Old, New, New, Old}));
+}
+
+/// A region at a place, with a sample from `start` on, and what it is after a run that leaves it there.
+RegionPieces left(const ArdourSession::Region& region)
+{
+    const SessionClock clock = clockAt("48000");
+    const auto event =
+        eventOf(region, clock, clock.secondsOf(region.position), clock.secondsOf(region.position + region.length), 0.0);
+    return {region, piecesOf(region, {event.get()}, clock)};
+}
+
+TEST(RegionPiece, HasASeamWhereAnotherRegionFollowsThatWasCutFromTheSame)
+{
+    constexpr CutMark Cut{RegionEdge::New, 64};
+    const ArdourSession::Region first{{}, 1000, 3000, 500, 11, {}, Cut};
+    const ArdourSession::Region second{{}, 4000, 7000, 3500, 11, Cut, {}};
+    const auto edgesOf = [&](const ArdourSession::Region& next) {
+        std::vector<RegionPieces> playlist{left(first), left(next)};
+        findSeams(playlist);
+        return std::pair(playlist[0].pieces.at(0).tail, playlist[1].pieces.at(0).head);
+    };
+    using enum RegionEdge;
+    EXPECT_EQ(edgesOf(second), std::pair(Seam, Seam));
+    ArdourSession::Region other = second;
+    other.source = 12;
+    EXPECT_EQ(edgesOf(other), std::pair(New, New));
+    other = second;
+    other.start = 3501;
+    EXPECT_EQ(edgesOf(other), std::pair(New, New));
+    other = second;
+    other.position = 4001;
+    EXPECT_EQ(edgesOf(other), std::pair(New, New));
+    // The user himself has put them together.
+    other = second;
+    other.head.reset();
+    EXPECT_EQ(edgesOf(other), std::pair(New, Old));
+}
+
+TEST(RegionPiece, KeepsAnEdgeThatIsAsItWasBeforeTheRun)
+{
+    constexpr CutMark Cut{RegionEdge::New, 64};
+    const ArdourSession::Region first{{}, 1000, 3000, 500, 11, {}, Cut};
+    const ArdourSession::Region second{{}, 4000, 7000, 3500, 11, Cut, {}};
+    const auto isAll = [&](std::int64_t moved) {
+        std::vector<RegionPieces> playlist{left(first), left(second)};
+        playlist[1].pieces.at(0).position += moved;
+        findSeams(playlist);
+        return std::pair(playlist[0].pieces.at(0).isAll(first), playlist[1].pieces.at(0).keepsHead());
+    };
+    // The user himself may have put them together, with the fades that they have.
+    EXPECT_EQ(isAll(0), std::pair(true, true));
+    EXPECT_EQ(isAll(1), std::pair(false, false));
+
+    // The user may have taken the other piece away.
+    std::vector<RegionPieces> alone{left(second)};
+    findSeams(alone);
+    EXPECT_TRUE(alone[0].pieces.at(0).isAll(second));
 }
 
 TEST(RegionPiece, IsNoneWhenItPlaysNotASample)
@@ -112,6 +173,8 @@ class CutRegion : public testing::Test {
 protected:
     std::int64_t edgeFade = ArdourSession::DefaultFade;
 
+    ArdourSession::Region region = Whole;
+
     pugi::xml_node cut(const std::string& content, const RegionPiece& piece, const std::string& attributes = "")
     {
         m_document.load_string(("<Region start=\"a2940000\" length=\"a58800000@a5880000\" sync-position=\"a2940000\" "
@@ -120,8 +183,13 @@ protected:
                                 attributes + ">" + content + "</Region>")
                                    .c_str());
         pugi::xml_node element = m_document.document_element();
-        cutRegion(element, Whole, piece, clockAt("48000"), edgeFade, [this] { return m_nextId++; });
+        cutRegion(element, region, piece, clockAt("48000"), edgeFade, [this] { return m_nextId++; });
         return element;
+    }
+    /// A fade that an element has.
+    static FadeCurve curveOf(const pugi::xml_node& element, const char* name)
+    {
+        return {element.child(name).child("AutomationList"), clockAt("48000")};
     }
     static std::string fade(const std::string& name, long samples, const std::string& values = "0 1")
     {
@@ -190,7 +258,7 @@ TEST_F(CutRegion, FadesAtANewEdgeAsLongAsTheUserWants)
 {
     edgeFade = 480;
     const pugi::xml_node element =
-        cut(fade("FadeIn", 800), {48000, 5000, 600, RegionEdge::New, RegionEdge::New}, "id=\"51\"");
+        cut(fade("FadeIn", 800), {48000, 5000, 1300, RegionEdge::New, RegionEdge::New}, "id=\"51\"");
     EXPECT_EQ(lengthOf(element, "FadeIn"), 480);
     EXPECT_EQ(lengthOf(element, "FadeOut"), 480);
     EXPECT_EQ(lengthOf(element, "InverseFadeOut"), 480);
@@ -201,15 +269,129 @@ TEST_F(CutRegion, FadesAtANewEdgeAsLongAsTheUserWants)
 TEST_F(CutRegion, HasNoFadeAtANewEdgeWhenTheUserWantsNone)
 {
     edgeFade = 0;
-    const pugi::xml_node element = cut(fade("FadeIn", 800), {48000, 5000, 600, RegionEdge::New, RegionEdge::New});
+    const pugi::xml_node element = cut(fade("FadeIn", 800), {48000, 5000, 1300, RegionEdge::New, RegionEdge::New});
     EXPECT_STREQ(element.attribute("fade-in-active").value(), "0");
     EXPECT_STREQ(element.attribute("fade-out-active").value(), "0");
 }
 
 TEST_F(CutRegion, HasNoFadeAtASeam)
 {
-    const pugi::xml_node element = cut(fade("FadeIn", 800), {48000, 5000, 600, RegionEdge::Seam, RegionEdge::Seam});
+    const pugi::xml_node element = cut(fade("FadeIn", 800), {48000, 5000, 1300, RegionEdge::Seam, RegionEdge::Seam});
     EXPECT_STREQ(element.attribute("fade-in-active").value(), "0");
+    EXPECT_STREQ(element.attribute("fade-out-active").value(), "0");
+}
+
+TEST_F(CutRegion, GoesOnWithTheRestOfAFadeThatWasCut)
+{
+    // 100 samples into a fade of 800.
+    const pugi::xml_node element = cut(fade("FadeIn", 800) + fade("InverseFadeIn", 800, "1 0"),
+                                       {48000, 5000, 600, RegionEdge::New, RegionEdge::New});
+    const FadeCurve in = curveOf(element, "FadeIn");
+    EXPECT_EQ(lengthOf(element, "FadeIn"), 700);
+    EXPECT_EQ(in.at(0.0), 0.0);
+    // Half of the short fade over the cut, over 132 of 800 samples.
+    EXPECT_NEAR(in.at(32.0), 0.70711 * 132 / 800, 1e-5);
+    EXPECT_NEAR(in.at(64.0), 164.0 / 800, 1e-9);
+    EXPECT_NEAR(in.at(350.0), 450.0 / 800, 1e-6);
+    EXPECT_NEAR(in.at(700.0), 1.0, 1e-9);
+    const FadeCurve below = curveOf(element, "InverseFadeIn");
+    EXPECT_NEAR(below.at(0.0), 1.0, 1e-9);
+    EXPECT_NEAR(below.at(350.0), 350.0 / 800, 1e-6);
+    EXPECT_STREQ(element.attribute("fade-in-active").value(), "1");
+    EXPECT_STREQ(element.attribute("default-fade-in").value(), "0");
+    EXPECT_STREQ(element.child("FadeIn").child("AutomationList").attribute("interpolation-style").value(), "Linear");
+}
+
+TEST_F(CutRegion, GoesOnWithAFadeAtASeamAsIfItWereWhole)
+{
+    const std::string fades = fade("FadeIn", 800) + fade("FadeOut", 1000, "1 0");
+    const pugi::xml_node first = cut(fades, {48000, 100, 500, RegionEdge::Old, RegionEdge::Seam});
+    EXPECT_EQ(lengthOf(first, "FadeIn"), 100);
+    EXPECT_NEAR(curveOf(first, "FadeIn").at(100.0), 100.0 / 800, 1e-9);
+    EXPECT_STREQ(first.attribute("fade-out-active").value(), "0");
+    const pugi::xml_node second = cut(fades, {48100, 9400, 600, RegionEdge::Seam, RegionEdge::Seam});
+    EXPECT_NEAR(curveOf(second, "FadeIn").at(0.0), 100.0 / 800, 1e-9);
+    EXPECT_EQ(lengthOf(second, "FadeIn"), 700);
+    EXPECT_EQ(lengthOf(second, "FadeOut"), 500);
+    EXPECT_NEAR(curveOf(second, "FadeOut").at(500.0), 0.5, 1e-9);
+    const pugi::xml_node third = cut(fades, {57500, 500, 10000, RegionEdge::Seam, RegionEdge::Old});
+    EXPECT_NEAR(curveOf(third, "FadeOut").at(0.0), 0.5, 1e-9);
+    EXPECT_EQ(lengthOf(third, "FadeOut"), 500);
+    EXPECT_STREQ(third.attribute("fade-in-active").value(), "0");
+}
+
+TEST_F(CutRegion, EndsWithAShortFadeWithinALongOne)
+{
+    const pugi::xml_node element = cut(fade("FadeIn", 800), {48000, 400, 500, RegionEdge::Old, RegionEdge::New});
+    EXPECT_EQ(lengthOf(element, "FadeIn"), 336);
+    EXPECT_NEAR(curveOf(element, "FadeIn").at(336.0), 336.0 / 800, 1e-9);
+    EXPECT_EQ(lengthOf(element, "FadeOut"), 64);
+    const FadeCurve out = curveOf(element, "FadeOut");
+    EXPECT_NEAR(out.at(0.0), 336.0 / 800, 1e-9);
+    EXPECT_NEAR(out.at(32.0), 0.70711 * 368 / 800, 1e-5);
+    EXPECT_EQ(out.at(64.0), 0.0);
+}
+
+TEST_F(CutRegion, HasNoFadesThatOverlapWhereThoseOfItsRegionDid)
+{
+    // Of two fades that overlap Ardour adds what each lets through, the first under the inverse of the second.
+    const std::string fades = fade("FadeIn", 8000) + fade("FadeOut", 8000, "1 0") + fade("InverseFadeOut", 8000, "0 1");
+    const pugi::xml_node element = cut(fades, {48000, 6000, 500, RegionEdge::Old, RegionEdge::Seam});
+    EXPECT_LE(lengthOf(element, "FadeIn") + (element.child("FadeOut") ? lengthOf(element, "FadeOut") : 0), 6000);
+    // At sample 4,000: half of the first fade, of which the inverse lets a quarter through, and three quarters.
+    EXPECT_NEAR(curveOf(element, "FadeIn").at(4000.0), 0.5 * 0.25 + 0.75, 1e-6);
+    EXPECT_NEAR(curveOf(element, "FadeIn").at(1000.0), 0.125, 1e-6);
+}
+
+TEST_F(CutRegion, LosesTheShortFadesOfACutWhereItsPiecesMeetAgain)
+{
+    const pugi::xml_node cutOnce = cut("", {48000, 5000, 2500, RegionEdge::New, RegionEdge::New});
+    EXPECT_STREQ(cutOnce.attribute("fade-in-active").value(), "1");
+    region = {
+        {}, 48000, 5000, 2500, 11, CutMark::read(cutOnce, "head", 2500, 64), CutMark::read(cutOnce, "tail", 7500, 64)};
+    ASSERT_TRUE(region.head && region.tail);
+    pugi::xml_document document;
+    pugi::xml_node element = document.append_copy(cutOnce);
+    cutRegion(element, region, {3000, 5000, 2500, RegionEdge::Seam, RegionEdge::New, false, true}, clockAt("48000"),
+              480, [] { return 1; });
+    EXPECT_STREQ(element.attribute("fade-in-active").value(), "0");
+    // The other end is as the first run left it.
+    EXPECT_STREQ(element.attribute("fade-out-active").value(), "1");
+    EXPECT_STREQ(element.attribute("default-fade-out").value(), "1");
+    EXPECT_EQ(CutMark::read(element, "head", 2500, 0)->edge, RegionEdge::Seam);
+    EXPECT_EQ(CutMark::read(element, "tail", 7500, 64)->fade, 64);
+}
+
+TEST_F(CutRegion, HasTheRestOfAFadeWithoutTheShortOneWhereItsPiecesMeetAgain)
+{
+    const pugi::xml_node cutOnce = cut(fade("FadeIn", 800) + fade("InverseFadeIn", 800, "1 0"),
+                                       {48000, 5000, 600, RegionEdge::New, RegionEdge::New});
+    region = {
+        {}, 48000, 5000, 600, 11, CutMark::read(cutOnce, "head", 600, 700), CutMark::read(cutOnce, "tail", 5600, 64)};
+    ASSERT_TRUE(region.head && region.tail);
+    pugi::xml_document document;
+    pugi::xml_node element = document.append_copy(cutOnce);
+    cutRegion(element, region, {3000, 5000, 600, RegionEdge::Seam, RegionEdge::Seam}, clockAt("48000"), 64,
+              [] { return 1; });
+    const FadeCurve in = curveOf(element, "FadeIn");
+    EXPECT_EQ(lengthOf(element, "FadeIn"), 700);
+    for (const int sample : {0, 1, 32, 63, 64, 65, 350, 700})
+        EXPECT_NEAR(in.at(sample), (100.0 + sample) / 800, sample < 64 ? 2e-3 : 1e-6) << sample;
+    EXPECT_NEAR(curveOf(element, "InverseFadeIn").at(32.0), 668.0 / 800, 5e-3);
+    EXPECT_STREQ(element.attribute("fade-out-active").value(), "0");
+}
+
+TEST_F(CutRegion, GetsAShortFadeWhereASeamIsPulledApart)
+{
+    const pugi::xml_node cutOnce = cut("", {48000, 5000, 2500, RegionEdge::Seam, RegionEdge::Seam});
+    region = {
+        {}, 48000, 5000, 2500, 11, CutMark::read(cutOnce, "head", 2500, 0), CutMark::read(cutOnce, "tail", 7500, 0)};
+    ASSERT_TRUE(region.head && region.tail);
+    pugi::xml_document document;
+    pugi::xml_node element = document.append_copy(cutOnce);
+    cutRegion(element, region, {3000, 5000, 2500, RegionEdge::New, RegionEdge::Seam, false, true}, clockAt("48000"), 64,
+              [] { return 1; });
+    EXPECT_STREQ(element.attribute("fade-in-active").value(), "1");
     EXPECT_STREQ(element.attribute("fade-out-active").value(), "0");
 }
 

@@ -41,7 +41,7 @@ TEST(SessionClock, CountsSuperclocks)
     EXPECT_EQ(clock.samples("a282240000"), 48000);
     EXPECT_EQ(clock.samples("a5880"), 1);
     EXPECT_EQ(clock.timeText(1), "a5880");
-    EXPECT_EQ(clock.timeText(1, 1), "a5879");
+    EXPECT_EQ(clock.timeText(1, true), "a5879");
 }
 
 TEST(SessionClock, RoundsDownToTheSample)
@@ -57,6 +57,7 @@ TEST(SessionClock, CountsPlainSamplesBeforeVersion7000)
     EXPECT_EQ(clock.seconds("44100"), 1.0);
     EXPECT_EQ(clock.samples("22050"), 22050);
     EXPECT_EQ(clock.timeText(22050), "22050");
+    EXPECT_EQ(clock.timeText(22050, true), "22049");
     EXPECT_THROW(clock.seconds("a22050"), FileFault);
 }
 

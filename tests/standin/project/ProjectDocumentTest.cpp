@@ -242,6 +242,67 @@ TEST(ProjectDocument, AStorageListenerIsThereOnceAndNotNull)
     EXPECT_NE(host.document()->removeStorageNotification(nullptr), ResultOk);
 }
 
+TEST(ProjectDocument, TellsWhetherAllListenersHaveStoredWhatTheyHave)
+{
+    TestHost host;
+    std::vector<std::string> calls;
+    const auto good = makeCounted<Recorder>(calls, "good ");
+    const auto bad = makeCounted<Recorder>(calls, "bad ");
+    bad->answer = ResultFalse;
+    EXPECT_TRUE(host.project.announceStoring());
+    host.document()->addStorageNotification(bad.get());
+    host.document()->addStorageNotification(good.get());
+
+    EXPECT_FALSE(host.project.announceStoring());
+    EXPECT_EQ(calls, (std::vector<std::string>{"bad storing", "good storing"}));
+    host.document()->removeStorageNotification(bad.get());
+    EXPECT_TRUE(host.project.announceStoring());
+    host.document()->removeStorageNotification(good.get());
+}
+
+TEST(ProjectDocument, CountsTheChangesThatNoUndoTakesBack)
+{
+    TestHost host;
+    const auto count = [&] { return host.project.link()->unrecordedChanges(); };
+    const TestHost::Node track = host.addTrack(TypeWord::Audio, u"DX 1");
+    auto& ours = dynamic_cast<Track&>(*track);
+    const std::uint64_t before = count();
+
+    host.edit(u"Lock", [&] { ours.setLocked(true); });
+    host.undo();
+    host.redo();
+    EXPECT_EQ(count(), before);
+    ours.setLocked(true);
+    ours.setSelected(false);
+    EXPECT_EQ(count(), before);
+
+    ours.setLocked(false);
+    EXPECT_EQ(count(), before + 1);
+    ours.setSelected(true);
+    EXPECT_EQ(count(), before + 2);
+    ours.remove();
+    EXPECT_EQ(count(), before + 3);
+    ours.setName(u"FX 1");
+    EXPECT_EQ(count(), before + 4);
+}
+
+TEST(ProjectDocument, CountsNoChangeOfItsOwnValuesButEachOfItsPool)
+{
+    TestHost host;
+    const auto count = [&] { return host.project.link()->unrecordedChanges(); };
+    const std::uint64_t before = count();
+
+    host.project.setName(u"Reel 3");
+    host.project.setProjectEnd(5.0);
+    host.project.setSelected(true);
+    EXPECT_EQ(count(), before);
+    MediaClip& clip = host.addMedia(u"/fx/door.wav", 2.0);
+    const std::uint64_t added = count();
+    EXPECT_GT(added, before);
+    host.edit(u"Name", [&] { clip.setName(u"Door"); });
+    EXPECT_GT(count(), added);
+}
+
 TEST(ProjectDocument, AStorageListenerThatAnotherRemovesIsNotToldAnyMore)
 {
     TestHost host;

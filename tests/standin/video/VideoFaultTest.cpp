@@ -2,6 +2,7 @@
 
 // Files that have no pictures, or not all of them.
 
+#include "standin/video/PictureReader.h"
 #include "standin/video/VideoError.h"
 #include "standin/video/VideoFile.h"
 #include "tests/support/TempFolder.h"
@@ -9,6 +10,8 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <cstdint>
 #include <cstdlib>
 #include <filesystem>
 #include <functional>
@@ -163,10 +166,22 @@ TEST(VideoFault, TheFramesAroundABrokenPartAreStillShown)
     }
 }
 
+TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeIsBroken)
+{
+    const TempFolder folder;
+    std::string bytes = contentOf(videoOf(Film));
+    // The table of the sizes of the pictures claims to have half a thousand million, each of its own size.
+    const std::size_t table = bytes.find("stsz");
+    ASSERT_NE(table, std::string::npos);
+    bytes.replace(table + 8, 8, std::string("\x00\x00\x00\x00\x1f\xff\xff\x00", 8));
+
+    EXPECT_EQ(reasonToOpen(folder.write("greedy.mp4", bytes)), Reason::Broken);
+}
+
 TEST(VideoFault, APictureOfTooManyPixelsIsNotRead)
 {
     const TempFolder folder;
-    // A file that claims to have a picture of 16384 by 16384 pixels.
+    // 67 million, and 37 million are the most.
     const fs::path large = madeFile(folder, "large.mov", "-f lavfi -i color=red:s=16384x4096 -frames:v 1 -c:v mjpeg");
 
     EXPECT_EQ(reasonToOpen(large), Reason::TooLarge);
@@ -181,6 +196,45 @@ TEST(VideoFault, WhatIsNotThereInTimeIsGivenUp)
     VideoFile file(path, inGoodTime());
     EXPECT_EQ(reasonOf([&] { file.picture(100, {25, 1}, Box, past); }), Reason::TooSlow);
     EXPECT_EQ(numberIn(file.picture(100, {25, 1}, Box, inGoodTime())), 100);
+}
+
+TEST(VideoFault, AReaderThatCantStartAnewStaysWhole)
+{
+    const TempFolder folder;
+    const fs::path path = folder.write("film.mp4", contentOf(videoOf(Film)));
+    PictureReader reader(path, inGoodTime());
+    const Ratio timeBase = reader.timeBase();
+    const auto picture = owned(av_frame_alloc());
+
+    reader.setDeadline(std::chrono::steady_clock::now() - std::chrono::seconds(1));
+    EXPECT_EQ(reasonOf([&] { reader.rewind(); }), Reason::TooSlow);
+    reader.setDeadline(inGoodTime());
+    fs::remove(path);
+    EXPECT_EQ(reasonOf([&] { reader.rewind(); }), Reason::Missing);
+
+    EXPECT_EQ(reader.timeBase(), timeBase);
+    EXPECT_TRUE(reader.seek(0));
+    EXPECT_TRUE(reader.next(*picture));
+}
+
+TEST(VideoFault, WhatWasGivenUpGoesOnAtTheNextRequest)
+{
+    // One key picture, and so many pictures after it that they aren't decoded in a twentieth of a second.
+    const VideoRecipe recipe{"one-group.mp4", 400, "25", "-c:v libx264 -preset ultrafast -g 400 ", 1280, 720};
+    VideoFile file(videoOf(recipe), inGoodTime());
+    const auto ask = [&](std::uint32_t frame) {
+        return numberIn(
+            file.picture(frame, {25, 1}, Box, std::chrono::steady_clock::now() + std::chrono::milliseconds(50)));
+    };
+    const Picture wanted = VideoFile(videoOf(recipe), inGoodTime()).picture(399, {25, 1}, Box, inGoodTime());
+
+    int requests = 1;
+    while (requests < 1000 && reasonOf([&] { ask(399); }) == Reason::TooSlow)
+        ++requests;
+
+    EXPECT_GT(requests, 1);
+    EXPECT_EQ(ask(399), 399);
+    EXPECT_TRUE(file.picture(399, {25, 1}, Box, inGoodTime()).pixels == wanted.pixels);
 }
 
 TEST(VideoError, EachReasonHasASentence)

@@ -7,6 +7,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cstdint>
 #include <optional>
 #include <random>
 #include <string>
@@ -28,14 +30,21 @@ const std::string Mpeg2 = "-c:v mpeg2video -b:v 3M -g 15 -bf 2 ";
 const std::string ProRes = "-c:v prores_ks -profile:v 0 ";
 const std::string Film = "24000/1001";
 const std::string Television = "30000/1001";
+const std::string FastTelevision = "60000/1001";
 
 std::vector<VideoRecipe> recipes()
 {
     std::vector<VideoRecipe> all;
-    for (const std::string& rate : {Film, Television}) {
-        const std::string label = rate == Film ? "film" : "television";
-        // The timecode of the file counts drop-frame at 29.97.
-        const std::string timecode = rate == Film ? "-timecode 01:00:59:12 " : "-timecode '01:00:59;20' ";
+    struct Kind {
+        std::string rate;
+        std::string label;
+        std::string timecode;
+    };
+    // The timecode of the file counts drop-frame at 29.97 and 59.94.
+    for (const auto& [rate, label, start] :
+         {Kind{Film, "film", "01:00:59:12"}, Kind{Television, "television", "01:00:59;20"},
+          Kind{FastTelevision, "fast-television", "01:00:59;50"}}) {
+        const std::string timecode = "-timecode '" + start + "' ";
         all.push_back({label + ".mp4", 300, rate, OpenGroups + timecode});
         all.push_back({label + ".mov", 300, rate, OpenGroups + timecode});
         all.push_back({label + ".ts", 300, rate, OpenGroups});
@@ -49,7 +58,7 @@ std::vector<VideoRecipe> recipes()
 
 double rateOf(const VideoRecipe& recipe)
 {
-    return recipe.rate == Film ? 23.976 : 29.97;
+    return recipe.rate == Film ? 23.976 : recipe.rate == Television ? 29.97 : 59.94;
 }
 
 /// The number in the picture of a frame, or why there is none.
@@ -114,5 +123,39 @@ INSTANTIATE_TEST_SUITE_P(Videos, VideoFileOfEachKind, testing::ValuesIn(recipes(
         character = std::isalnum(static_cast<unsigned char>(character)) ? character : '_';
     return name;
 });
+
+TEST(VideoFile, AFrameIsTheSamePictureHoweverItIsReached)
+{
+    // Grain, B frames of which others depend on some, and groups that are longer than the pictures that are kept.
+    const VideoRecipe recipe{"same.mp4", 200, "24",
+                             "-vf noise=alls=12:allf=t " + H264 +
+                                 "-x264-params keyint=120:min-keyint=120:scenecut=0:b-adapt=0:open-gop=1 "};
+    const Ratio rate{24, 1};
+    std::vector<std::vector<std::uint8_t>> pictures;
+    PictureReader reader(videoOf(recipe), inGoodTime());
+    PictureDrawing drawing;
+    const auto decoded = owned(av_frame_alloc());
+    while (reader.next(*decoded))
+        pictures.push_back(drawing.draw(*decoded, {1, 1}, {}, Box).pixels);
+    ASSERT_EQ(pictures.size(), 200U);
+    VideoFile file(videoOf(recipe), inGoodTime());
+    const auto expectSame = [&](std::uint32_t frame) {
+        EXPECT_TRUE(file.picture(frame, rate, Box, inGoodTime()).pixels == pictures[frame]) << frame;
+    };
+
+    std::mt19937 random(3);
+    for (int round = 0; round < 40; ++round) {
+        auto frame = static_cast<std::uint32_t>(random() % 200U);
+        expectSame(frame);
+        // A walk from there, now forward and now backward.
+        for (int step = 0; step < 12; ++step) {
+            const std::uint32_t by = random() % 3U == 0 ? static_cast<std::uint32_t>(random() % 20U) : 1U;
+            frame = random() % 4U == 0 ? std::min(frame + by, 199U) : frame - std::min(frame, by);
+            expectSame(frame);
+        }
+    }
+    for (std::uint32_t frame = 200; frame-- > 0;)
+        expectSame(frame);
+}
 
 } // namespace standin::tests

@@ -12,7 +12,10 @@
 
 #include <algorithm>
 #include <array>
+#include <cstddef>
+#include <cstdint>
 #include <cstdlib>
+#include <cstring>
 #include <filesystem>
 #include <string>
 #include <utility>
@@ -135,6 +138,46 @@ TEST(VideoPicture, AMatrixThatIsNotToldGoesByTheSize)
 {
     expectColour(pictureOf(flat("small.mp4", 126, 128, 168, Lossless)), 192, 96, 128);
     expectColour(pictureOf(flat("large.mp4", 126, 128, 168, Lossless, 1280, 720)), 200, 107, 128);
+}
+
+TEST(VideoPicture, AMatrixThatNobodyKnowsCountsAsNone)
+{
+    const TempFolder folder;
+    std::string bytes = cadrel::tests::contentOf(
+        videoOf(flat("named.mov", 126, 128, 168, "-c:v prores_ks -profile:v 0 -pix_fmt yuv422p10le ")));
+    // The head of a frame begins eight bytes after the start of the frame, four after its mark. Its byte 16 is the matrix.
+    constexpr std::size_t MatrixAfterMark = 4 + 16;
+    std::size_t frames = 0;
+    for (std::size_t mark = bytes.find("icpf"); mark != std::string::npos; mark = bytes.find("icpf", mark + 1)) {
+        bytes[mark + MatrixAfterMark] = static_cast<char>(142);
+        ++frames;
+    }
+    ASSERT_EQ(frames, 2U);
+
+    VideoFile file(folder.write("unknown.mov", bytes), inGoodTime());
+
+    expectColour(file.picture(1, {24, 1}, Box, inGoodTime()), 192, 96, 128);
+}
+
+TEST(VideoPicture, FieldsOfADecodedPictureMayHoldAnyNumber)
+{
+    const auto picture = owned(av_frame_alloc());
+    picture->width = 64;
+    picture->height = 48;
+    picture->format = AV_PIX_FMT_YUV420P;
+    ASSERT_EQ(av_frame_get_buffer(picture.get(), 0), 0);
+    const auto fill = [&](int plane, std::uint8_t value) {
+        std::fill_n(picture->data[plane], picture->linesize[plane] * (plane == 0 ? 48 : 24), value);
+    };
+    fill(0, 126);
+    fill(1, 128);
+    fill(2, 168);
+    for (const int number : {142, 255, -1}) {
+        std::memcpy(&picture->colorspace, &number, sizeof(number));
+        std::memcpy(&picture->color_range, &number, sizeof(number));
+
+        expectColour(PictureDrawing().draw(*picture, {1, 1}, {}, Box), 192, 96, 128);
+    }
 }
 
 TEST(VideoPicture, TenBitsAreShownInEight)

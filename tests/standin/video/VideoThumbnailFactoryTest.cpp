@@ -12,9 +12,12 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <filesystem>
 #include <string>
 #include <vector>
+
+#include <sys/stat.h>
 
 using namespace Velmark;
 
@@ -179,6 +182,40 @@ TEST(VideoThumbnailFactory, TellsWhyThereIsNoPicture)
     host.expectReason(host.addVideo(u"text.mov", 4.0), 0, VideoError::Reason::Broken, {text});
     host.expectReason(host.addVideo(u"sound.wav", 4.0), 0, VideoError::Reason::NoPicture, {sound});
     host.expectReason(host.addVideo(film.u16string().c_str(), 5.0), 96, VideoError::Reason::PastTheEnd, {film});
+}
+
+TEST(VideoThumbnailFactory, GivesUpWhatTakesTooLongBeforeItsModuleDoes)
+{
+    VideoHost host;
+    const fs::path one = host.folder / "one.mjpeg";
+    ASSERT_EQ(
+        std::system(
+            ("ffmpeg -nostdin -v error -f lavfi -i testsrc2=s=4096x2304 -frames:v 1 '" + one.string() + "'").c_str()),
+        0);
+    // Nothing tells how long this is, so that all of it has to be decoded.
+    std::string many;
+    const std::string picture = contentOf(one);
+    for (int number = 0; number < 400; ++number)
+        many += picture;
+    const fs::path slow = host.folder.write("slow.mjpeg", many);
+    constexpr std::chrono::seconds PatienceOfTheModule{2};
+
+    const auto begun = std::chrono::steady_clock::now();
+    host.expectReason(host.addVideo(u"slow.mjpeg", 4.0), 90, VideoError::Reason::TooSlow, {slow});
+
+    EXPECT_LT(std::chrono::steady_clock::now() - begun, PatienceOfTheModule);
+    EXPECT_EQ(host.numberAt(host.addVideo(videoOf(Film).u16string().c_str(), 4.0), 40), 40);
+}
+
+TEST(VideoThumbnailFactory, DoesNotWaitForWhatComesThroughAPipe)
+{
+    VideoHost host;
+    const fs::path pipe = host.folder / "pipe.mov";
+    ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
+
+    host.expectReason(host.addVideo(u"pipe.mov", 4.0), 0, VideoError::Reason::Broken, {pipe});
+
+    EXPECT_EQ(host.numberAt(host.addVideo(videoOf(Film).u16string().c_str(), 4.0), 40), 40);
 }
 
 TEST(VideoThumbnailFactory, NoticesThatTheOpenFileWasDeletedAndCameBack)

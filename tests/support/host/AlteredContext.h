@@ -5,6 +5,7 @@
 #include "velmark/Context.h"
 #include "velmark/Implements.h"
 
+#include <functional>
 #include <utility>
 #include <vector>
 
@@ -18,7 +19,7 @@ public:
     /// The host is the one behind it, not owned; null for none.
     explicit AlteredContext(Velmark::IHostContext* host) : m_host(host) {}
 
-    void hide(const Velmark::Identifier& id) { m_altered.push_back({id, nullptr}); }
+    void hide(const Velmark::Identifier& id) { replace(id, nullptr); }
     /// The host's own again.
     void unhide(const Velmark::Identifier& id)
     {
@@ -27,7 +28,16 @@ public:
     /// What is given instead has to answer to the identifier.
     void replace(const Velmark::Identifier& id, Velmark::Counted<Velmark::FObject> object)
     {
-        m_altered.push_back({id, std::move(object)});
+        m_altered.push_back({id, [id, object = std::move(object)](void** out) {
+                                 return object ? object->queryInterface(id, out) : Velmark::ResultFalse;
+                             }});
+    }
+    /// The objects of a class are others from now on.
+    void makeInstead(const Velmark::Identifier& classId, std::function<Velmark::Counted<Velmark::FObject>()> make)
+    {
+        m_altered.push_back({classId, [make = std::move(make)](void** out) {
+                                 return make()->queryInterface(Velmark::FUnknown::iid, out);
+                             }});
     }
 
     /// Its services are found in this way too, as with any host.
@@ -37,10 +47,10 @@ public:
     }
     Velmark::int32 getInterface(const Velmark::Identifier& id, void** out) override
     {
-        for (const auto& [altered, object] : m_altered) {
+        for (const auto& [altered, give] : m_altered) {
             if (altered == id) {
                 *out = nullptr;
-                return object ? object->queryInterface(id, out) : Velmark::ResultFalse;
+                return give(out);
             }
         }
         if (m_host)
@@ -51,7 +61,7 @@ public:
 
 private:
     Velmark::IHostContext* m_host;
-    std::vector<std::pair<Velmark::Identifier, Velmark::Counted<Velmark::FObject>>> m_altered;
+    std::vector<std::pair<Velmark::Identifier, std::function<Velmark::int32(void**)>>> m_altered;
 };
 
 } // namespace cadrel::host::tests

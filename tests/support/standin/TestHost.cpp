@@ -172,7 +172,7 @@ int32 Recorder::note(const char* call)
     m_calls.push_back(m_prefix + call);
     if (whenCalled)
         whenCalled(m_calls.back());
-    return ResultOk;
+    return answer;
 }
 
 } // namespace standin::tests

@@ -96,6 +96,8 @@ public:
 
     /// What is done in each call, which is named as it is written down.
     std::function<void(const std::string& call)> whenCalled;
+    /// What each call gives back.
+    Velmark::int32 answer = Velmark::ResultOk;
 
     Velmark::int32 update(Velmark::FUnknown* changed, Velmark::int32 message) override;
     Velmark::int32 projectActivated(Velmark::IProjectDocument*) override { return note("activated"); }

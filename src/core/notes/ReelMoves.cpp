@@ -1,0 +1,127 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "core/notes/ReelMoves.h"
+
+#include "core/notes/ReelTimeline.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <iterator>
+#include <utility>
+#include <vector>
+
+namespace cadrel::core {
+
+namespace {
+
+class ReelMover {
+public:
+    ReelMover(StepList& list, const Programme& oldCut, const Programme& newCut, const Framerate& framerate)
+        : m_list(list), m_oldCut(oldCut), m_newCut(newCut), m_timeline(courses(), framerate)
+    {
+    }
+
+    void addSteps()
+    {
+        for (std::size_t reel = 0; reel < m_list.rows.size(); ++reel) {
+            std::vector<NoteRow> rows;
+            for (const ReelShift& shift : m_timeline.makeRoomFor(reel))
+                rows.emplace_back(stepOf(shift));
+            for (NoteRow& row : m_list.rows[reel])
+                tellStarts(row);
+            rows.insert(rows.end(), std::make_move_iterator(m_list.rows[reel].begin()),
+                        std::make_move_iterator(m_list.rows[reel].end()));
+            m_list.rows[reel] = std::move(rows);
+        }
+    }
+
+private:
+    const Reel* oldReelOf(std::size_t reel) const
+    {
+        const auto& place = m_list.reels[reel].oldReel;
+        return place ? &m_oldCut.reels()[*place] : nullptr;
+    }
+
+    const Reel* newReelOf(std::size_t reel) const
+    {
+        const auto& place = m_list.reels[reel].newReel;
+        return place ? &m_newCut.reels()[*place] : nullptr;
+    }
+
+    std::vector<ReelCourse> courses() const
+    {
+        std::vector<ReelCourse> courses(m_list.reels.size());
+        std::vector<std::int32_t> lengths(courses.size(), 0);
+        for (std::size_t reel = 0; reel < courses.size(); ++reel) {
+            if (const Reel* const was = oldReelOf(reel)) {
+                courses[reel].oldStart = was->timecodeStart;
+                lengths[reel] = courses[reel].mostEver = was->length;
+            }
+            if (const Reel* const is = newReelOf(reel))
+                courses[reel].newStart = is->timecodeStart;
+        }
+        for (std::size_t reel = 0; reel < courses.size(); ++reel) {
+            courses[reel].mostBefore = courses[reel].mostEver;
+            for (const NoteRow& row : m_list.rows[reel]) {
+                const auto* const step = std::get_if<NoteStep>(&row);
+                if (step == nullptr)
+                    continue;
+                // What is moved is out of its reel before it is in the other one.
+                lengths[step->from.reel] -= step->moved;
+                lengths[step->place.reel] += step->moved + step->lengthChange();
+                ReelCourse& course = courses[step->place.reel];
+                course.mostEver = std::max(course.mostEver, lengths[step->place.reel]);
+            }
+        }
+        return courses;
+    }
+
+    NoteStep stepOf(const ReelShift& shift) const
+    {
+        const Reel* const was = oldReelOf(shift.reel);
+        const Reel* const is = newReelOf(shift.reel);
+        PictureChange change;
+        change.kind = ChangeKind::ReelMoved;
+        change.frames = shift.to - shift.from;
+        if (was != nullptr)
+            change.inOld = {was->start, was->length};
+        if (is != nullptr)
+            change.inNew = {is->start, is->length};
+        change.isOutOfTheWay = shift.isOutOfTheWay;
+        NoteStep step;
+        step.action = StepAction::MoveReel;
+        step.place = {shift.reel, 0, shift.to};
+        step.from = {shift.reel, 0, shift.from};
+        step.changes = {change};
+        return step;
+    }
+
+    void tellStarts(NoteRow& row) const
+    {
+        const auto tell = [this](WorkPlace& place) { place.reelStart = m_timeline.startOf(place.reel); };
+        if (auto* const end = std::get_if<MoveEnd>(&row))
+            tell(end->place);
+        auto* const step = std::get_if<NoteStep>(&row);
+        if (step == nullptr)
+            return;
+        tell(step->place);
+        tell(step->from);
+        for (WorkPlace& place : step->doubledFrom)
+            tell(place);
+    }
+
+    StepList& m_list;
+    const Programme& m_oldCut;
+    const Programme& m_newCut;
+    ReelTimeline m_timeline;
+};
+
+} // namespace
+
+void moveReels(StepList& list, const Programme& oldCut, const Programme& newCut, const Framerate& framerate)
+{
+    ReelMover(list, oldCut, newCut, framerate).addSteps();
+}
+
+} // namespace cadrel::core

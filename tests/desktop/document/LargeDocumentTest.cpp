@@ -1,0 +1,66 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+// What the mark of unsaved work costs where the bytes of the project cost much.
+
+#include "standin/project/ClipEvent.h"
+#include "tests/desktop/document/DocumentHost.h"
+#include "tests/support/SecondsOf.h"
+
+namespace desktop::tests {
+
+using cadrel::tests::secondsOf;
+
+class LargeDocumentTest : public DocumentTest {
+protected:
+    static constexpr int Tracks = 20;
+    static constexpr int Clips = 2000; // on each
+
+    OpenDocument& opened()
+    {
+        standin::ChangeLog log;
+        const auto project = Velmark::makeCounted<Project>(log);
+        for (int number = 0; number < Tracks; ++number) {
+            const auto track = Track::create(Track::Kind::Audio);
+            for (int clip = 0; clip < Clips; ++clip) {
+                const auto event = Velmark::makeCounted<standin::ClipEvent>();
+                event->setSpan(clip, clip + 1.0);
+                event->insertInto(*track);
+            }
+            track->insertInto(*project);
+        }
+        standin::ProjectFile::write(*project, folder / "film.stage");
+        return documents.open(folder / "film.stage");
+    }
+};
+
+TEST_F(LargeDocumentTest, ToAskForTheMarkAfterEachOfAThousandEditsCostsLessThanTheBytesOnce)
+{
+    OpenDocument& document = opened();
+    const double once = secondsOf([&] { bytesOf(document); });
+    int unsaved = 0;
+
+    const double asked = secondsOf([&] {
+        for (int number = 1; number <= 1000; ++number) {
+            renameTrack(document, number % 2 == 0 ? u"A" : u"B");
+            unsaved += document.isUnsaved() ? 1 : 0;
+        }
+    });
+
+    EXPECT_EQ(unsaved, 1000);
+    EXPECT_LT(asked, once);
+}
+
+TEST_F(LargeDocumentTest, AnIdleCallWithoutAChangeCostsAFractionOfTheBytes)
+{
+    OpenDocument& document = opened();
+    const double once = secondsOf([&] { bytesOf(document); });
+
+    const double idled = secondsOf([&] {
+        for (int number = 0; number < 20; ++number)
+            idle();
+    });
+
+    EXPECT_LT(idled, once);
+}
+
+} // namespace desktop::tests
