@@ -41,7 +41,9 @@ DesktopProgram::DesktopProgram(const ModulePlaces& places)
     view.onCommand = [this](int command) { later([=, this] { choose(command); }); };
     view.onTabChosen = [this](std::size_t tab) { later([=, this] { m_documents.activate(m_documents.at(tab)); }); };
     view.onTabClosed = [this](std::size_t tab) { later([=, this] { m_workspace.close(m_documents.at(tab)); }); };
-    view.onFilesDropped = [this](const std::vector<fs::path>& files) { later([=, this] { takeDropped(files); }); };
+    view.onFilesDropped = [this](const std::vector<fs::path>& files, juce::Point<int> place) {
+        later([=, this] { takeDropped(files, place); });
+    };
     view.isBlocked = [this] { return m_boxes.isOpen(); };
     m_window.onClose = [this] { later([this] { quit(); }); };
     m_boxes.setOpenChanged([&view](bool isOpen) { view.embedded().setCovered(isOpen); });
@@ -176,19 +178,29 @@ void DesktopProgram::openRecent(std::size_t index)
         open({entries[index].path});
 }
 
-void DesktopProgram::takeDropped(const std::vector<fs::path>& files)
+void DesktopProgram::takeDropped(const std::vector<fs::path>& files, juce::Point<int> place)
 {
     std::vector<fs::path> projects;
+    std::vector<std::string> lists;
     for (const fs::path& file : files) {
         const DroppedFile kind = droppedFile(file);
         if (kind == DroppedFile::Project)
             projects.push_back(file);
         else if (kind == DroppedFile::Edl)
-            m_workspace.tell("Add " + file.filename().string() + " with the button + above Old EDL or New EDL.");
+            lists.push_back(file.string());
         else
-            m_workspace.tell(file.filename().string() + " is no project.");
+            m_workspace.tell(file.filename().string() + " is no project and no EDL.");
     }
     open(projects);
+    if (!lists.empty())
+        passLists(lists, place);
+}
+
+void DesktopProgram::passLists(const std::vector<std::string>& files, juce::Point<int> place)
+{
+    EmbeddedView& embedded = m_window.view().embedded();
+    if (!embedded.drop(files, embedded.getLocalPoint(&m_window.view(), place)))
+        m_workspace.tell("Drop EDLs on the table of Cadrel's window for which they are.");
 }
 
 void DesktopProgram::open(const std::vector<fs::path>& files)

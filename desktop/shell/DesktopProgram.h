@@ -21,6 +21,7 @@
 #include <map>
 #include <memory>
 #include <optional>
+#include <string>
 #include <vector>
 
 namespace desktop {
@@ -48,7 +49,9 @@ private:
     void chooseView(int command, TracksView& view);
     void chooseModuleCommand(std::size_t index);
     void openRecent(std::size_t index);
-    void takeDropped(const std::vector<std::filesystem::path>& files);
+    void takeDropped(const std::vector<std::filesystem::path>& files, juce::Point<int> place);
+    /// Lists are for the module's view, on which they have to be dropped.
+    void passLists(const std::vector<std::string>& files, juce::Point<int> place);
     void open(const std::vector<std::filesystem::path>& files);
     void quit();
     void showModuleWindow();

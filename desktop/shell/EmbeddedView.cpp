@@ -158,6 +158,15 @@ void EmbeddedView::giveKeyboardAway()
         m_window->container().giveKeyboardAway();
 }
 
+bool EmbeddedView::drop(const std::vector<std::string>& files, juce::Point<int> place)
+{
+    if (!m_window || !m_window->isShown() || m_isCovered || !getLocalBounds().contains(place))
+        return false;
+    const juce::Point<double> pixels = place.toDouble() * juce::Desktop::getInstance().getGlobalScaleFactor();
+    m_window->container().drop(files, static_cast<int>(pixels.x), static_cast<int>(pixels.y));
+    return true;
+}
+
 void EmbeddedView::pass(const XContainer::Key& key)
 {
     if (juce::ComponentPeer* const peer = getPeer(); peer && !m_isCovered)

@@ -8,6 +8,7 @@
 #include <juce_gui_basics/juce_gui_basics.h>
 
 #include <string>
+#include <vector>
 
 namespace desktop {
 
@@ -30,6 +31,9 @@ public:
     void setCovered(bool isCovered);
     /// To our own window, when the keyboard is in the module's.
     void giveKeyboardAway();
+
+    /// On the module's view, at a place of this component. False where there is none.
+    bool drop(const std::vector<std::string>& files, juce::Point<int> place);
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;

@@ -138,13 +138,13 @@ bool MainView::isInterestedInFileDrag(const juce::StringArray& /*files*/)
     return !isBlocked || !isBlocked();
 }
 
-void MainView::filesDropped(const juce::StringArray& files, int /*x*/, int /*y*/)
+void MainView::filesDropped(const juce::StringArray& files, int x, int y)
 {
     std::vector<std::filesystem::path> paths;
     for (const juce::String& file : files)
         paths.emplace_back(file.toStdString());
     if (onFilesDropped)
-        onFilesDropped(paths);
+        onFilesDropped(paths, {x, y});
 }
 
 juce::StringArray MainView::getMenuBarNames()

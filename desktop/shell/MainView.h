@@ -32,7 +32,8 @@ public:
     std::function<void(int command)> onCommand;
     std::function<void(std::size_t tab)> onTabChosen;
     std::function<void(std::size_t tab)> onTabClosed;
-    std::function<void(const std::vector<std::filesystem::path>& files)> onFilesDropped;
+    /// The place is in this view.
+    std::function<void(const std::vector<std::filesystem::path>& files, juce::Point<int> place)> onFilesDropped;
     /// Whether commands are refused now, because a box is open.
     std::function<bool()> isBlocked;
 

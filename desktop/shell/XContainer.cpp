@@ -6,6 +6,8 @@
 #include <X11/Xutil.h>
 
 #include <algorithm>
+#include <array>
+#include <string_view>
 
 namespace desktop {
 
@@ -46,6 +48,72 @@ XContainer::Key keyOf(XKeyEvent event)
     return key;
 }
 
+constexpr const char* UriList = "text/uri-list";
+
+Atom atomOf(Display* display, const char* name)
+{
+    return XInternAtom(display, name, False);
+}
+
+/// With every byte in its number that has a meaning of its own there.
+std::string uriOf(const std::string& file)
+{
+    constexpr std::string_view Plain = "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789-._~/";
+    constexpr std::string_view Digits = "0123456789ABCDEF";
+    std::string uri = "file://";
+    for (const char each : file) {
+        const auto byte = static_cast<unsigned char>(each);
+        if (Plain.find(each) != std::string_view::npos)
+            uri += each;
+        else
+            uri.append("%").append(1, Digits[byte >> 4U]).append(1, Digits[byte & 15U]);
+    }
+    return uri;
+}
+
+Window firstChildOf(Display* display, Window window)
+{
+    Window root = 0;
+    Window parent = 0;
+    Window* children = nullptr;
+    unsigned count = 0;
+    if (XQueryTree(display, window, &root, &parent, &children, &count) == 0)
+        return 0;
+    const Window first = count > 0 ? children[0] : 0;
+    if (children)
+        XFree(children);
+    return first;
+}
+
+/// A message of the protocol for dragging between programs.
+void tell(Display* display, Window window, const char* message, const std::array<long, 5>& data)
+{
+    XEvent event = {};
+    event.xclient.type = ClientMessage;
+    event.xclient.window = window;
+    event.xclient.message_type = atomOf(display, message);
+    event.xclient.format = 32;
+    std::copy(data.begin(), data.end(), event.xclient.data.l);
+    XSendEvent(display, window, False, NoEventMask, &event);
+}
+
+void answer(Display* display, const XSelectionRequestEvent& request, const std::string& text)
+{
+    XEvent event = {};
+    event.xselection.type = SelectionNotify;
+    event.xselection.requestor = request.requestor;
+    event.xselection.selection = request.selection;
+    event.xselection.target = request.target;
+    event.xselection.time = request.time;
+    if (request.target == atomOf(display, UriList)) {
+        event.xselection.property = request.property;
+        XChangeProperty(display, request.requestor, request.property, request.target, 8, PropModeReplace,
+                        reinterpret_cast<const unsigned char*>(text.data()), static_cast<int>(text.size()));
+    }
+    XSendEvent(display, request.requestor, False, NoEventMask, &event);
+    XFlush(display);
+}
+
 } // namespace
 
 XContainer::XContainer(Window around) : m_around(around)
@@ -81,6 +149,8 @@ void XContainer::serve()
         XNextEvent(display, &event);
         if (event.type == MappingNotify)
             XRefreshKeyboardMapping(&event.xmapping);
+        if (event.type == SelectionRequest)
+            answer(display, event.xselectionrequest, m_dropped);
         if (event.type == KeyPress && onKey)
             onKey(keyOf(event.xkey));
     }
@@ -145,6 +215,30 @@ std::optional<XContainer::Picture> XContainer::picture() const
     }
     XDestroyImage(image);
     return picture;
+}
+
+void XContainer::drop(const std::vector<std::string>& files, int x, int y)
+{
+    Display* const display = m_connection.display();
+    const Window view = firstChildOf(display, m_window);
+    if (view == 0)
+        return;
+    m_dropped.clear();
+    for (const std::string& file : files)
+        m_dropped += uriOf(file) + "\r\n";
+    int left = 0;
+    int top = 0;
+    Window child = 0;
+    XTranslateCoordinates(display, m_window, DefaultRootWindow(display), x, y, &left, &top, &child);
+    XSetSelectionOwner(display, atomOf(display, "XdndSelection"), m_window, CurrentTime);
+    const long copy = static_cast<long>(atomOf(display, "XdndActionCopy"));
+    constexpr long Version = 5L << 24;
+    tell(display, view, "XdndEnter",
+         {static_cast<long>(m_window), Version, static_cast<long>(atomOf(display, UriList)), 0, 0});
+    tell(display, view, "XdndPosition",
+         {static_cast<long>(m_window), 0, (static_cast<long>(left) << 16) | top, CurrentTime, copy});
+    tell(display, view, "XdndDrop", {static_cast<long>(m_window), 0, CurrentTime, 0, 0});
+    XFlush(display);
 }
 
 bool XContainer::hasKeyboard() const

@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <functional>
 #include <optional>
+#include <string>
 #include <vector>
 
 namespace desktop {
@@ -62,6 +63,9 @@ public:
     /// Of the part that is on the screen; nothing while it isn't shown.
     std::optional<Picture> picture() const;
 
+    /// Drops files on the view, as if the user had dragged them there from another program. The place is in this window.
+    void drop(const std::vector<std::string>& files, int x, int y);
+
     /// Whether the keyboard is in it or in what it holds.
     bool hasKeyboard() const;
     /// Gives the keyboard to the window around it.
@@ -72,6 +76,7 @@ private:
     Window m_around;
     Window m_window = 0;
     Place m_place;
+    std::string m_dropped; ///< what the view asks for: a line for each file
     bool m_isShown = false;
 };
 

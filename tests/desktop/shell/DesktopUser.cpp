@@ -165,6 +165,24 @@ void DesktopUser::closeWindow()
     XSync(m_display, False);
 }
 
+void DesktopUser::picture(const std::string& name)
+{
+    // Longer than from a change to its being drawn.
+    constexpr int StillTurns = 40;
+    std::vector<char> shown;
+    int still = 0;
+    waitFor("the window comes to rest", [&] {
+        auto now = m_windows.pixelsOf(m_window);
+        still = now == shown ? still + 1 : 0;
+        shown = std::move(now);
+        return still > StillTurns;
+    });
+    const std::filesystem::path folder =
+        std::filesystem::path(cadrel::tests::programPath("../window")).lexically_normal();
+    std::filesystem::create_directories(folder);
+    m_windows.writePicture(m_window, folder / (name + ".png"));
+}
+
 std::string DesktopUser::title() const
 {
     return m_window != 0 ? nameOf(m_display, m_window) : "";

@@ -4,6 +4,7 @@
 
 #include "tests/module/WindowPlaces.h"
 #include "tests/support/x11/XUser.h"
+#include "tests/support/x11/XWindows.h"
 
 #include <filesystem>
 #include <functional>
@@ -42,6 +43,9 @@ public:
     /// As a window manager does it for the user.
     void closeWindow();
 
+    /// Writes what the window shows to the folder `window` of the build, when it has come to rest. Without a window manager.
+    void picture(const std::string& name);
+
     std::string title() const;
     bool isBoxOpen() const;
     void waitForBox(bool isOpen);
@@ -64,6 +68,7 @@ private:
     unsigned long m_container = 0; ///< what Cadrel's lies in
     cadrel::tests::WindowPlaces m_places;
     cadrel::tests::XUser m_user;
+    cadrel::tests::XWindows m_windows;
 };
 
 } // namespace desktop::tests

@@ -75,8 +75,17 @@ protected:
             m_manager.emplace();
         for (const char* const name : {"reel3.stage", "reel3_v07.edl", "reel3_v12.edl"})
             fs::copy_file(exampleFile(name), m_folder / name);
+        // Where they have been rendered, its videos are seen.
+        if (fs::exists(exampleFile("Video")))
+            fs::create_directory_symlink(exampleFile("Video"), m_folder / "Video");
     }
 
+    /// For the manual, in which nothing has a frame of a window manager's.
+    void picture(const std::string& name)
+    {
+        if (!GetParam())
+            m_user->picture(name);
+    }
     void start() { m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}); }
     void addCut(const std::string& button, const char* file)
     {
@@ -135,9 +144,15 @@ constexpr double SameInstant = 1.0 / 384000;
 TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
 {
     start();
+    picture("desktop-open");
     addCuts();
     m_user->click(DesktopUser::Main, "Generate Button");
     m_user->save();
+    m_user->click(DesktopUser::Main, "Change Table List Box Row");
+    m_user->press(XK_Down);
+    m_user->press(XK_Down);
+    picture("desktop-generated");
+    m_user->save(); // with what is selected
     const auto generated = storedModel();
     EXPECT_EQ(generated->oldEdl().size(), 152U);
     EXPECT_EQ(generated->newEdl().size(), 153U);
@@ -147,10 +162,14 @@ TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
 
     m_user->click(DesktopUser::Main, "Cadrel Button");
     m_user->waitForBox(true);
+    picture("desktop-question");
     m_user->press(XK_Return); // Keep
     m_user->waitForBox(false);
     m_user->save();
     EXPECT_NEAR(storedStartOf(Clip), NewStart, SameInstant);
+    m_user->press('g');
+    picture("desktop-conformed");
+    m_user->press('g');
 
     m_user->press('z', XK_Control_L);
     m_user->save();

@@ -17,7 +17,7 @@ namespace {
 namespace fs = std::filesystem;
 
 /// A user at the desk, who answers boxes as he has decided beforehand.
-class WorkspaceTest : public DocumentHost {
+class WorkspaceTest : public testing::Test, protected DocumentHost {
 protected:
     OpenDocument& opened(const char* name = "reel.stage")
     {
