@@ -30,7 +30,9 @@ function(cadrel_juce_library target)
         JUCE_GLOBAL_MODULE_SETTINGS_INCLUDED=1
         JUCE_STANDALONE_APPLICATION=0
         JUCE_USE_CURL=0
-        $<IF:$<CONFIG:Debug>,_DEBUG=1,NDEBUG=1>)
+        $<IF:$<CONFIG:Debug>,_DEBUG=1,NDEBUG=1>
+        # Its assertions say on stderr what is used wrongly.
+        $<$<BOOL:${CADREL_SANITIZE}>:JUCE_LOG_ASSERTIONS=1>)
     foreach(module IN LISTS ARG_MODULE)
         target_compile_definitions(${target} PUBLIC JUCE_MODULE_AVAILABLE_${module}=1)
     endforeach()

@@ -140,7 +140,9 @@ std::vector<Span> ChangeMap::formerPlaces(const Span& stretch) const
     if (m_state != State::Carried)
         return places;
     m_byPresent.visitTouching(stretch.start, stretch.end, [&](std::size_t at) {
-        const auto& [event, former, present, isReversed] = m_stretches[at];
+        const Span& former = m_stretches[at].former;
+        const Span& present = m_stretches[at].present;
+        const bool isReversed = m_stretches[at].isReversed;
         const Span piece{std::max(stretch.start, present.start), std::min(stretch.end, present.end)};
         const bool hasLength = stretch.end - stretch.start >= SameInstant;
         if (hasLength ? piece.end - piece.start < SameInstant : present.end - piece.start < SameInstant)

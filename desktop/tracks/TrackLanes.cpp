@@ -84,6 +84,16 @@ BlockColours coloursOf(const Track& track, Lane::Kind kind, bool isMarked)
     return {Palette::eventBlue, TracksPalette::soundBody, Palette::light};
 }
 
+/// A single short clip stands out; a field of them is as calm as one clip.
+PaletteColour stripColour(const Track& track, const Columns& strip)
+{
+    if (track.isLocked())
+        return TracksPalette::lockedName;
+    if (track.kind() == Track::Kind::Video)
+        return TracksPalette::pictureName;
+    return strip.count() < 3 * LaneBlocks::LeastBlock ? TracksPalette::soundSliver : TracksPalette::soundStrip;
+}
+
 /// Only the part of a long line of dashes that can be seen.
 void drawDashes(juce::Graphics& graphics, Columns columns, int y, Columns seen)
 {
@@ -206,12 +216,10 @@ void TrackLanes::paintLane(juce::Graphics& graphics, const TrackRow& row, const 
         end = std::max(end, block.columns.end);
         paintBlock(graphics, row, lane, block, area);
     }
-    const bool isPicture = row.track->kind() == Track::Kind::Video;
-    graphics.setColour(toColour(row.track->isLocked() ? TracksPalette::lockedName
-                                : isPicture           ? TracksPalette::pictureName
-                                                      : TracksPalette::soundStrip));
-    for (const Columns& strip : drawn.strips)
+    for (const Columns& strip : drawn.strips) {
+        graphics.setColour(toColour(stripColour(*row.track, strip)));
         graphics.fillRect(strip.first, area.getY(), strip.count(), area.getHeight());
+    }
 }
 
 void TrackLanes::paintBlock(juce::Graphics& graphics, const TrackRow& row, const Lane& lane,

@@ -22,7 +22,8 @@ UserBoxes::FileQuestion questionOf(const char16_t* title, const FileType* filter
     question.title = title ? title : u"";
     question.isSave = isSave;
     for (int32 index = 0; index < filterCount; ++index)
-        question.filters.push_back({std::string(textOf(filters[index].extension)), std::string(textOf(filters[index].description))});
+        question.filters.push_back(
+            {std::string(textOf(filters[index].extension)), std::string(textOf(filters[index].description))});
     std::array<char16_t, IFilePath::Capacity> folder{};
     if (path.getPath(folder.data()) == ResultOk)
         question.folder = folder.data();

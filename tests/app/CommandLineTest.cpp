@@ -37,7 +37,8 @@ TEST(CommandLine, HelpOfEachCommandHasAnExample)
                                                       {"generate", "--help"},
                                                       {"apply", "--help"},
                                                       {"list", "--help"},
-                                                      {"show", "--help"}, {"open", "--help"}}) {
+                                                      {"show", "--help"},
+                                                      {"open", "--help"}}) {
         const Outcome outcome = runCadrel(arguments);
 
         EXPECT_EQ(outcome.status, 0);

@@ -14,6 +14,7 @@
 
 #include <X11/keysym.h>
 
+#include <algorithm>
 #include <array>
 #include <chrono>
 #include <cstdlib>
@@ -21,6 +22,7 @@
 #include <iostream>
 #include <map>
 #include <random>
+#include <utility>
 
 namespace cadrel::tests {
 namespace {
@@ -86,6 +88,18 @@ protected:
 
     // ---- What came of it
 
+    /// What the user's acts have done, so that a test sees whether they reach the window at all.
+    struct Effects {
+        std::size_t made = 0;    ///< entries of undo lists, also by redo
+        std::size_t undone = 0;  ///< not by undoAll()
+        std::size_t windows = 0; ///< menus and the like beside the host's window
+        std::size_t told = 0;    ///< alerts and other messages
+
+        bool areEnough() const { return made >= 5 && undone >= 1 && windows >= 5; }
+    };
+    void look();
+    void lookAtEntries(standin::Project& project);
+    void lookAtMessages();
     void expectNamedEntries();
     /// Takes everything back and expects what there was when the project was opened.
     void undoAll(standin::Project& project);
@@ -94,7 +108,10 @@ protected:
     const std::uint64_t m_seed = setting("CADREL_WINDOW_SEED", std::random_device()());
     SeededChance m_chance{m_seed};
     std::ofstream m_log;
-    std::map<standin::Project*, std::string> m_first; ///< what was in each project when it was opened
+    std::map<standin::Project*, std::string> m_first;     ///< what was in each project when it was opened
+    std::map<standin::Project*, std::size_t> m_doneCount; ///< entries that were done when they were last looked at
+    Effects m_effects;
+    int m_windowCount = 0;
 };
 
 /// The tracks, the pool and the lists. Sorting, selection and settings aren't steps of the undo list, nor is what the transport does.
@@ -113,6 +130,7 @@ void RandomUserTest::openOne(const char* name)
     standin::Project& project = open(m_folder / name);
     turn();
     m_first[&project] = contentOf(project);
+    m_doneCount[&project] = project.undoList().doneCount();
 }
 
 void RandomUserTest::useMouse()
@@ -221,6 +239,7 @@ void RandomUserTest::useProjects()
         if (m_chance.oneIn(2))
             undoAll(*one);
         m_first.erase(one);
+        m_doneCount.erase(one);
         return m_application.closeProject(*one);
     case 3:
         m_log << "activate none";
@@ -267,6 +286,32 @@ void RandomUserTest::act()
         work();
 }
 
+void RandomUserTest::lookAtEntries(standin::Project& project)
+{
+    const std::size_t now = project.undoList().doneCount();
+    const std::size_t before = std::exchange(m_doneCount[&project], now);
+    m_effects.made += now > before ? now - before : 0;
+    m_effects.undone += before > now ? before - now : 0;
+}
+
+/// What a failure within the window would be told as.
+void RandomUserTest::lookAtMessages()
+{
+    const std::string told = messages();
+    m_effects.told += static_cast<std::size_t>(std::count(told.begin(), told.end(), '\n'));
+    for (const char* const internal :
+         {"This could not be carried out.", "The data is damaged", "There is not enough memory"})
+        EXPECT_EQ(told.find(internal), std::string::npos) << told;
+}
+
+void RandomUserTest::look()
+{
+    forEachProject([this](standin::Project& project) { lookAtEntries(project); });
+    lookAtMessages();
+    const int windows = m_windows.windowCount();
+    m_effects.windows += windows > std::exchange(m_windowCount, windows) ? 1 : 0;
+}
+
 void RandomUserTest::expectNamedEntries()
 {
     forEachProject([](standin::Project& project) {
@@ -287,6 +332,8 @@ void RandomUserTest::undoAll(standin::Project& project)
             work();
     }
     turn();
+    m_doneCount[&project] = project.undoList().doneCount();
+    lookAtMessages();
     // Which picture a track has is said of it like a setting; nobody has said it of the films.
     for (standin::Track* const track : project.allTracks())
         track->removeAttribute(Velmark::AttributeKey::VideoType);
@@ -302,14 +349,21 @@ TEST_F(RandomUserTest, LeavesNothingThatCannotBeUndone)
     for (int box = 0; box < 2000; ++box)
         chooseFiles();
 
-    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(setting("CADREL_WINDOW_SECONDS", 10));
+    using std::chrono::steady_clock;
+    const auto end = steady_clock::now() + std::chrono::seconds(setting("CADREL_WINDOW_SECONDS", 10));
+    // A short run may have done little by chance.
+    const auto latestEnd = end + std::chrono::minutes(1);
     std::uint64_t acts = 0;
-    while (std::chrono::steady_clock::now() < end && !HasFailure()) {
+    while (!HasFailure() && steady_clock::now() < (m_effects.areEnough() ? end : latestEnd)) {
         act();
+        look();
         expectNamedEntries();
         ++acts;
     }
+    std::cout << acts << " acts, " << m_effects.made << " entries made, " << m_effects.undone << " undone, "
+              << m_effects.windows << " windows opened, " << m_effects.told << " messages" << std::endl;
     EXPECT_GT(acts, 100U);
+    EXPECT_TRUE(m_effects.areEnough()) << "the acts don't reach the window";
 
     forEachProject([this](standin::Project& project) {
         undoAll(project);

@@ -7,7 +7,7 @@
 
 #include <algorithm>
 #include <cctype>
-#include <string>
+#include <string_view>
 
 namespace cadrel::core {
 
@@ -26,10 +26,11 @@ bool fillsProgramme(const EventBase& event, const Framerate& framerate)
 
 bool isBlack(const EventBase& event)
 {
-    std::string roll = event.rollName();
-    std::transform(roll.begin(), roll.end(), roll.begin(),
-                   [](unsigned char letter) { return static_cast<char>(std::toupper(letter)); });
-    return roll == "BL" || roll == "BLACK";
+    const auto isRoll = [&roll = event.rollName()](std::string_view name) {
+        return std::equal(roll.begin(), roll.end(), name.begin(), name.end(),
+                          [](unsigned char letter, char capital) { return std::toupper(letter) == capital; });
+    };
+    return isRoll("BL") || isRoll("BLACK");
 }
 
 const EventBase* outgoingOf(const EventList& events, std::size_t index)

@@ -62,14 +62,43 @@ FrameRanges both(FrameRanges a, const FrameRanges& b)
     return united(std::move(a));
 }
 
-/// The events as a project stores them, which keeps no comments and so not the text of what can't be read.
-EventList asStored(const EventList& events)
+using SharedEvents = std::shared_ptr<const EventList>;
+
+SharedEvents readEvents(ByteArchive& archive)
+{
+    const auto events = std::make_shared<EventList>();
+    archive >> *events;
+    return events;
+}
+
+/// The events as a project stores them, which keeps neither comments, and so not the text of what can't be read, nor whether a
+/// shot runs backwards.
+SharedEvents asStored(const EventList& events)
 {
     ByteArchive archive;
     archive << events;
-    EventList stored;
-    archive >> stored;
-    return stored;
+    return readEvents(archive);
+}
+
+/// The same for comparing pictures. The events that a project stores with all that makes up their picture are shared.
+SharedEvents comparableTo(const EventList& events)
+{
+    const auto isStoredWhole = [](const EventBase& event) { return event.isValid() && !event.isReversed(); };
+    EventList others;
+    for (const auto& event : events.events()) {
+        if (!isStoredWhole(*event))
+            others.add(event);
+    }
+    const SharedEvents stored = asStored(others);
+    std::vector<std::shared_ptr<EventBase>> all = events.events();
+    auto next = stored->events().begin();
+    for (std::shared_ptr<EventBase>& event : all) {
+        if (!isStoredWhole(*event))
+            event = *next++;
+    }
+    const auto comparable = std::make_shared<EventList>();
+    comparable->append(std::move(all));
+    return comparable;
 }
 
 FrameRanges reelsOf(const FrameRanges& lit, const Framerate& framerate)
@@ -112,14 +141,8 @@ constexpr std::uint32_t BytesVersion = 0x52550001;
 void PastRuns::add(const EventList& oldCut, const EventList& newCut, const EventList& changes,
                    const FrameRange& allowed)
 {
-    addStored(asStored(oldCut), asStored(newCut), asStored(changes), allowed);
-}
-
-void PastRuns::addStored(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                         const FrameRange& allowed)
-{
-    Run run = runOf(oldCut, newCut, changes, allowed);
-    if (!run.isOfCuts() && run.changes.isEmpty())
+    Run run = runOf(asStored(oldCut), asStored(newCut), asStored(changes), allowed);
+    if (!run.isOfCuts() && run.changes->isEmpty())
         return;
     forgetWithin(run.extent);
     m_runs.push_back(std::move(run));
@@ -130,22 +153,22 @@ void PastRuns::forgetWithin(const FrameRanges& extent)
     std::erase_if(m_runs, [&extent](const Run& run) { return without(run.left, extent).empty(); });
 }
 
-PastRuns::Run PastRuns::runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
+PastRuns::Run PastRuns::runOf(SharedEvents oldCut, SharedEvents newCut, SharedEvents changes,
                               const FrameRange& allowed) const
 {
-    Run run{oldCut, newCut, EventList(), allowed, {}, {}};
+    const Framerate& framerate = m_context.framerate;
+    Run run{std::move(oldCut), std::move(newCut), std::move(changes), allowed, {}, {}};
     if (!run.isOfCuts()) {
-        run.changes = changes;
-        run.extent = within(allowed, hullOf(changes, m_context.framerate));
+        run.extent = within(allowed, hullOf(*run.changes, framerate));
         run.left = run.extent;
         return run;
     }
-    PictureNames names(m_context.matchBy, m_context.vfxPatterns);
-    const PictureLine oldLine(oldCut, names, m_context.framerate);
-    const PictureLine newLine(newCut, names, m_context.framerate);
-    run.extent = within(allowed, reelsOf(both(oldLine.lit(), newLine.lit()), m_context.framerate));
-    run.left = both(within(allowed, reelsOf(newLine.lit(), m_context.framerate)),
-                    without(reelsOf(oldLine.lit(), m_context.framerate), {allowed}));
+    // The cuts make their changes.
+    run.changes = std::make_shared<EventList>();
+    const FrameRanges oldLit = litFrames(*run.oldCut, framerate);
+    const FrameRanges newLit = litFrames(*run.newCut, framerate);
+    run.extent = within(allowed, reelsOf(both(oldLit, newLit), framerate));
+    run.left = both(within(allowed, reelsOf(newLit, framerate)), without(reelsOf(oldLit, framerate), {allowed}));
     if (run.left.empty())
         run.left = run.extent;
     return run;
@@ -155,13 +178,13 @@ std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut, c
 {
     const Framerate& framerate = m_context.framerate;
     PictureNames names(m_context.matchBy, m_context.vfxPatterns);
-    const PictureLine given(asStored(oldCut), names, framerate);
+    const PictureLine given(*comparableTo(oldCut), names, framerate);
     const FrameRanges givenReels = common(reelsOf(given.lit(), framerate), asked);
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend(); ++run) {
         if (run->isOfCuts()) {
-            const PictureLine began(run->oldCut, names, framerate);
-            const PictureLine standing(run->newCut, names, framerate);
+            const PictureLine began(*run->oldCut, names, framerate);
+            const PictureLine standing(*run->newCut, names, framerate);
             const FrameRanges changed = common(within(run->allowed, reelsOf(standing.lit(), framerate)), givenReels);
             const FrameRanges unchanged = common(without(reelsOf(began.lit(), framerate), {run->allowed}), givenReels);
             if (const auto difference = firstDifferenceIn(without(changed, hidden), standing, given))
@@ -182,24 +205,34 @@ std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut, c
     return std::nullopt;
 }
 
-EventList PastRuns::changesOf(const Run& run) const
+std::vector<ChangeStretch> PastRuns::stretchesOf(const Run& run) const
 {
     if (!run.isOfCuts())
-        return run.changes;
+        return core::stretchesOf(*run.changes, m_context.framerate);
     EventList changes;
     try {
         ChangeEdlGenerator generator;
-        generator.configure(m_context.matchBy, m_context.vfxPatterns);
-        generator.generate(run.oldCut, run.newCut, changes);
+        configure(generator);
+        generator.generate(*run.oldCut, *run.newCut, changes);
     } catch (Result::Type) {
         changes.clear();
     }
-    return changes;
+    return core::stretchesOf(changes, m_context.framerate);
+}
+
+/// Versions of VFX shots are different shots where the patterns can't be used.
+void PastRuns::configure(ChangeEdlGenerator& generator) const
+{
+    try {
+        generator.configure(m_context.matchBy, m_context.vfxPatterns);
+    } catch (Result::Type) {
+        generator.configure(m_context.matchBy, {});
+    }
 }
 
 bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven, const FrameRange& allowed) const
 {
-    const std::vector<ChangeStretch> stretches = stretchesOf(changes, m_context.framerate);
+    const std::vector<ChangeStretch> stretches = core::stretchesOf(changes, m_context.framerate);
     const FrameRanges hull = within(allowed, hullOf(changes, m_context.framerate));
     const bool movesAnything = std::any_of(stretches.begin(), stretches.end(),
                                            [](const ChangeStretch& stretch) { return stretch.shift != 0; });
@@ -208,8 +241,7 @@ bool PastRuns::haveCarriedOut(const EventList& changes, bool isGiven, const Fram
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend() && without(hull, hidden) == hull; ++run) {
         const bool isComparable = (isGiven || !run->isOfCuts()) && !within(allowed, run->extent).empty();
-        const std::vector<ChangeStretch> others =
-            isComparable ? stretchesOf(changesOf(*run), m_context.framerate) : std::vector<ChangeStretch>();
+        const std::vector<ChangeStretch> others = isComparable ? stretchesOf(*run) : std::vector<ChangeStretch>();
         if (std::equal(stretches.begin(), stretches.end(), others.begin(), others.end(), isSame))
             return true;
         hidden = both(std::move(hidden), run->extent);
@@ -223,11 +255,11 @@ std::string PastRuns::toBytes() const
     archive << BytesVersion;
     archive.writeCount(m_runs.size());
     for (const Run& run : m_runs)
-        archive << run.oldCut << run.newCut << run.changes << run.allowed.start << run.allowed.end;
+        archive << *run.oldCut << *run.newCut << *run.changes << run.allowed.start << run.allowed.end;
     return {archive.data(), archive.data() + archive.size()};
 }
 
-void PastRuns::read(const std::string& bytes)
+bool PastRuns::read(const std::string& bytes)
 {
     ByteArchive archive;
     archive.assign(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
@@ -236,18 +268,20 @@ void PastRuns::read(const std::string& bytes)
         std::uint32_t version = 0;
         archive >> version;
         if (version != BytesVersion)
-            return;
+            return false;
         for (std::size_t count = archive.readCount(); count > 0; --count) {
-            EventList oldCut;
-            EventList newCut;
-            EventList changes;
+            SharedEvents oldCut = readEvents(archive);
+            SharedEvents newCut = readEvents(archive);
+            SharedEvents changes = readEvents(archive);
             FrameRange allowed;
-            archive >> oldCut >> newCut >> changes >> allowed.start >> allowed.end;
-            addStored(oldCut, newCut, changes, allowed);
+            archive >> allowed.start >> allowed.end;
+            m_runs.push_back(runOf(std::move(oldCut), std::move(newCut), std::move(changes), allowed));
         }
     } catch (Result::Type) {
         m_runs.clear();
+        return false;
     }
+    return true;
 }
 
 } // namespace cadrel::core

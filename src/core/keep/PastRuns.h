@@ -10,11 +10,15 @@
 #include <cstddef>
 #include <cstdint>
 #include <limits>
+#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
 namespace cadrel::core {
+
+class ChangeEdlGenerator;
+struct ChangeStretch;
 
 /// The runs that a project has behind it, and so the cut that its sound stands in. A later run hides what an earlier one
 /// did at the same time of the programme.
@@ -48,33 +52,35 @@ public:
 
     /// The first frame at which the sound stands in another cut than the one given: at which the two differ where both
     /// have a reel, or where they end when a run began with just the cut that is given. Only frames in `asked` count.
+    /// Throws Result::InvalidArgument for a VFX pattern that can't be used.
     std::optional<std::int32_t> firstDifference(const EventList& oldCut, const FrameRanges& asked = {AllTime}) const;
     /// Whether a run has carried out this change EDL in some of `allowed`; one that moves nothing counts as none. A list
     /// that was `given` is compared with all runs, and one that was made of two cuts only with those of given lists.
     bool haveCarriedOut(const EventList& changes, bool isGiven, const FrameRange& allowed = AllTime) const;
 
-    /// For the model's properties. The reader takes what isn't such bytes for no runs.
+    /// For the model's properties.
     std::string toBytes() const;
-    void read(const std::string& bytes);
+    /// Reads them whatever the names are compared by. False for what isn't such bytes; there are no runs then.
+    bool read(const std::string& bytes);
 
 private:
     struct Run {
-        EventList oldCut;
-        EventList newCut;
-        EventList changes;
+        std::shared_ptr<const EventList> oldCut;
+        std::shared_ptr<const EventList> newCut;
+        std::shared_ptr<const EventList> changes;
         FrameRange allowed;
         FrameRanges extent; ///< the reels of both cuts, or the hull of the change EDL, within `allowed`
         FrameRanges left;   ///< the reels that the sound stands in after the run, or the hull likewise
 
-        bool isOfCuts() const { return !oldCut.isEmpty() || !newCut.isEmpty(); }
+        bool isOfCuts() const { return !oldCut->isEmpty() || !newCut->isEmpty(); }
     };
 
-    void addStored(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-                   const FrameRange& allowed);
-    Run runOf(const EventList& oldCut, const EventList& newCut, const EventList& changes,
-              const FrameRange& allowed) const;
+    /// The run of lists as a project stores them.
+    Run runOf(std::shared_ptr<const EventList> oldCut, std::shared_ptr<const EventList> newCut,
+              std::shared_ptr<const EventList> changes, const FrameRange& allowed) const;
     void forgetWithin(const FrameRanges& extent);
-    EventList changesOf(const Run& run) const;
+    std::vector<ChangeStretch> stretchesOf(const Run& run) const;
+    void configure(ChangeEdlGenerator& generator) const;
 
     Context m_context;
     std::vector<Run> m_runs; ///< the earliest first

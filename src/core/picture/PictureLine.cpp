@@ -8,6 +8,7 @@
 #include "core/picture/PictureNames.h"
 
 #include <algorithm>
+#include <optional>
 #include <set>
 #include <tuple>
 
@@ -23,12 +24,31 @@ struct LayerOrder {
     }
 };
 
+/// Where an event shows a picture, if it does.
+std::optional<FrameRange> framesOf(const EventBase& event, const Framerate& framerate)
+{
+    if (!fillsProgramme(event, framerate) || isBlack(event))
+        return std::nullopt;
+    return FrameRange{event.dstIn().toFrameCount(framerate), event.dstOut().toFrameCount(framerate)};
+}
+
 } // namespace
+
+FrameRanges litFrames(const EventList& events, const Framerate& framerate)
+{
+    std::vector<FrameRange> lit;
+    for (const auto& event : events.events()) {
+        if (const auto frames = framesOf(*event, framerate))
+            lit.push_back(*frames);
+    }
+    return united(std::move(lit));
+}
 
 PictureLine::PictureLine(const EventList& events, PictureNames& names, const Framerate& framerate)
 {
     addRuns(edgesOf(events, names, framerate));
     std::vector<FrameRange> frames;
+    frames.reserve(m_runs.size());
     for (const PictureRun& run : m_runs)
         frames.push_back(run.frames);
     m_lit = united(std::move(frames));
@@ -54,9 +74,10 @@ std::vector<PictureLine::Edge> PictureLine::edgesOf(const EventList& events, Pic
     };
     for (std::size_t index = 0; index < events.size(); ++index) {
         const EventBase& event = events.at(index);
-        if (!fillsProgramme(event, framerate) || isBlack(event))
+        const std::optional<FrameRange> shown = framesOf(event, framerate);
+        if (!shown)
             continue;
-        const FrameRange frames{event.dstIn().toFrameCount(framerate), event.dstOut().toFrameCount(framerate)};
+        const FrameRange frames = *shown;
         PictureLayer layer;
         layer.event = static_cast<std::uint32_t>(index);
         if (PictureNames::hasReadableSource(event, framerate)) {

@@ -15,6 +15,9 @@ namespace cadrel::core {
 class EventList;
 class PictureNames;
 
+/// Where a cut shows a picture: all events that have a DST, flawed ones too, except sound and black, in any order.
+FrameRanges litFrames(const EventList& events, const Framerate& framerate);
+
 /// One event's part in a picture. The source frame at a frame of the programme is `origin + frame * speed`.
 struct PictureLayer {
     std::int32_t material = 0; ///< by PictureNames
@@ -47,7 +50,7 @@ public:
     /// More layers at one frame are counted but not looked at.
     static constexpr std::size_t MostLayers = 64;
 
-    /// All events that have a DST, flawed ones too, except sound and the roll "BL" or "BLACK", which is black.
+    /// Of the events that litFrames() counts.
     PictureLine(const EventList& events, PictureNames& names, const Framerate& framerate);
 
     /// Ascending, without overlaps; neighbours that touch differ.

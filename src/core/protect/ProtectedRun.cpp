@@ -132,9 +132,7 @@ void ProtectedRun::putListInto(DataModel& model) const
 {
     if (m_source == Source::Given)
         return;
-    EventList kept = listOf(m_plan.events, model);
-    model.changeEdl().clear();
-    model.changeEdl().append(kept.release());
+    model.changeEdl() = listOf(m_plan.events, model);
 }
 
 void ProtectedRun::putStartableListInto(DataModel& model) const
@@ -143,9 +141,7 @@ void ProtectedRun::putStartableListInto(DataModel& model) const
         putListInto(model);
         return;
     }
-    EventList staying = listOf(m_plan.untouched, model);
-    model.changeEdl().clear();
-    model.changeEdl().append(staying.release());
+    model.changeEdl() = listOf(m_plan.untouched, model);
 }
 
 EventList ProtectedRun::carried(const DataModel& model) const

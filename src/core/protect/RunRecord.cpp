@@ -23,11 +23,28 @@ PastRuns noRuns(const Settings& settings)
     return PastRuns({settings.matchBy(), settings.vfxPatterns(), Timecode::framerate()});
 }
 
-void readProperty(const DataModel& model, PropertyKey::Type key, PastRuns& runs)
+/// What a property holds. Nothing where it can't be read.
+std::optional<PastRuns> readProperty(const DataModel& model, PropertyKey::Type key)
 {
+    PastRuns runs = noRuns(model.settings());
     Variant stored;
-    if (model.getProperty(key, stored) == Result::Ok)
-        runs.read(stored.toText());
+    if (model.getProperty(key, stored) == Result::Ok && !runs.read(stored.toText()))
+        return std::nullopt;
+    return runs;
+}
+
+/// What was noted, by this version or an older one.
+std::optional<PastRuns> notedIn(const DataModel& model)
+{
+    return readProperty(model,
+                        model.hasProperty(PropertyKey::DoneRuns) ? PropertyKey::DoneRuns : PropertyKey::EarlierRuns);
+}
+
+/// What can't be read may be the note of a later version.
+void removeReadable(DataModel& model, PropertyKey::Type key)
+{
+    if (readProperty(model, key))
+        model.removeProperty(key);
 }
 
 } // namespace
@@ -44,41 +61,34 @@ FrameRange RunRecord::allowedBy(const Settings& settings)
 
 std::optional<PastRuns> RunRecord::find(const DataModel& model)
 {
-    PastRuns runs = noRuns(model.settings());
-    readProperty(model, PropertyKey::DoneRuns, runs);
-    return runs.isEmpty() ? std::nullopt : std::optional(std::move(runs));
+    std::optional<PastRuns> runs = notedIn(model);
+    return runs && !runs->isEmpty() ? std::move(runs) : std::nullopt;
 }
 
 PastRuns RunRecord::findOrGuess(const DataModel& model, const FrameRange& allowed)
 {
-    if (std::optional<PastRuns> noted = find(model))
-        return *std::move(noted);
-    PastRuns runs = noRuns(model.settings());
-    readProperty(model, PropertyKey::EarlierRuns, runs);
-    runs.add(model.oldEdl(), model.newEdl(), model.changeEdl(), allowed);
+    PastRuns runs = find(model).value_or(noRuns(model.settings()));
+    // An older version has noted only the runs before the last one.
+    if (runs.isEmpty() || !model.hasProperty(PropertyKey::DoneRuns))
+        runs.add(model.oldEdl(), model.newEdl(), model.changeEdl(), allowed);
     return runs;
 }
 
 void RunRecord::write(const PastRuns& runs, DataModel& model)
 {
-    model.removeProperty(PropertyKey::EarlierRuns);
-    if (runs.isEmpty())
-        model.removeProperty(PropertyKey::DoneRuns);
-    else
+    removeReadable(model, PropertyKey::EarlierRuns);
+    removeReadable(model, PropertyKey::DoneRuns);
+    if (!runs.isEmpty() && !model.hasProperty(PropertyKey::DoneRuns))
         model.setProperty(PropertyKey::DoneRuns, Variant(runs.toBytes()));
 }
 
 void RunRecord::addRun(DataModel& model, const FrameRange& allowed)
 {
-    try {
-        PastRuns runs = find(model).value_or(noRuns(model.settings()));
-        const bool isGiven = ProtectedRun::sourceOf(model) == ProtectedRun::Source::Given;
-        const EventList none;
-        runs.add(isGiven ? none : model.oldEdl(), isGiven ? none : model.newEdl(), model.changeEdl(), allowed);
-        write(runs, model);
-    } catch (Result::Type) {
-        model.removeProperty(PropertyKey::DoneRuns);
-    }
+    PastRuns runs = notedIn(model).value_or(noRuns(model.settings()));
+    const bool isGiven = ProtectedRun::sourceOf(model) == ProtectedRun::Source::Given;
+    const EventList none;
+    runs.add(isGiven ? none : model.oldEdl(), isGiven ? none : model.newEdl(), model.changeEdl(), allowed);
+    write(runs, model);
 }
 
 std::optional<std::int32_t> NextRun::firstDifference(const PastRuns& runs) const

@@ -21,17 +21,16 @@ namespace RunRecord {
 /// The frames of the new programme that a run with these settings may change.
 FrameRange allowedBy(const Settings& settings);
 
-/// The runs that were noted. Nothing in a project whose runs were done before there were notes, or where the note can't be
-/// read; such a note is passed over.
+/// The runs that were noted, also by an older version, which knew nothing of the last one. Nothing where there is no note or
+/// none that can be read.
 std::optional<PastRuns> find(const DataModel& model);
 /// The same, but without a note the lists of the model are taken for those of its last run, which could change `allowed`. So
 /// it is as long as nobody has changed them since.
 PastRuns findOrGuess(const DataModel& model, const FrameRange& allowed);
 
-/// Puts the runs in the place of those that were noted.
+/// Puts the runs in the place of those that were noted. A note that can't be read stays as it is.
 void write(const PastRuns& runs, DataModel& model);
-/// Notes that a run of the model's lists has been done, which could change `allowed`. Needs a frame rate; where the lists
-/// can't be compared, no run is noted any more.
+/// Notes that a run of the model's lists has been done, which could change `allowed`. Needs a frame rate.
 void addRun(DataModel& model, const FrameRange& allowed);
 
 } // namespace RunRecord

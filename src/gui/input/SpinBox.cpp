@@ -89,7 +89,7 @@ void SpinBox::setBackgroundColour(juce::Colour colour)
 
 void SpinBox::paint(juce::Graphics& graphics)
 {
-    guardSystem([&] { graphics.fillAll(m_backgroundColour); });
+    guardSystem([&] { graphics.fillAll(shaded(m_backgroundColour)); });
 }
 
 void SpinBox::paintOverChildren(juce::Graphics& graphics)
@@ -97,10 +97,6 @@ void SpinBox::paintOverChildren(juce::Graphics& graphics)
     guardSystem([&] {
         if (hasKeyboardFocus(false))
             drawFocusRing(graphics, m_valueDisplay.getBounds().toFloat(), 0.0F);
-        if (isEnabled())
-            return;
-        graphics.setColour(juce::Colour(DisabledShade));
-        graphics.fillRect(m_backgroundColour.isOpaque() ? getLocalBounds() : m_valueDisplay.getBounds());
     });
 }
 
@@ -163,8 +159,16 @@ void SpinBox::enablementChanged()
         // JUCE doesn't expect that a listener deletes the input meanwhile, so nobody is told.
         if (!isEnabled() && m_valueDisplay.isBeingEdited())
             showValue();
+        // The look dims what stands on it.
+        m_valueDisplay.setColour(juce::Label::backgroundColourId, shaded(juce::Colours::black));
         repaint();
     });
+}
+
+/// The ground of a disabled input; one that isn't drawn stays so.
+juce::Colour SpinBox::shaded(juce::Colour ground) const
+{
+    return isEnabled() || ground.isTransparent() ? ground : ground.overlaidWith(juce::Colour(DisabledShade));
 }
 
 void SpinBox::focusGained(FocusChangeType)

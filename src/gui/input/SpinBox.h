@@ -64,6 +64,7 @@ private:
         SpinBox& m_owner;
     };
 
+    juce::Colour shaded(juce::Colour ground) const;
     void openEditor();
     /// Closes the editor and takes what was typed. False when no editor was open.
     bool take();

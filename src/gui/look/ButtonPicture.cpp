@@ -170,6 +170,7 @@ ButtonTile tileOf(ButtonPicture::State state)
         state.isPressed && state.isEnabled ? ButtonTile::lit(toColour(Palette::light)) : ButtonTile::normal();
     tile.isEnabled = state.isEnabled;
     tile.hasFocus = state.hasFocus;
+    tile.isBeneath = state.isBeneath;
     return tile;
 }
 
@@ -177,7 +178,7 @@ juce::Colour symbolColour(ButtonPicture::State state)
 {
     const juce::Colour dark(0xff1b1f24);
     if (!state.isEnabled)
-        return disabledInk();
+        return disabledInk(state.isBeneath);
     return state.isPressed ? dark.brighter(0.25F) : dark;
 }
 

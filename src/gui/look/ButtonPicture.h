@@ -14,6 +14,7 @@ public:
         bool isPressed = false;
         bool isEnabled = true;
         bool hasFocus = false;
+        bool isBeneath = false; ///< all around it is disabled, too
     };
 
     explicit ButtonPicture(Symbol symbol);

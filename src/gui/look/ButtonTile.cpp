@@ -41,16 +41,16 @@ void ButtonTile::draw(juce::Graphics& graphics, juce::Rectangle<float> area) con
         graphics.fillRoundedRectangle(inner, InnerCorner);
     }
     if (isOn) {
-        graphics.setColour(isEnabled ? juce::Colours::black : disabledInk());
+        graphics.setColour(isEnabled ? juce::Colours::black : disabledInk(isBeneath));
         graphics.fillRect(inner.reduced(BarInset, 1.0F).removeFromBottom(BarHeight));
     }
     if (hasFocus)
         drawFocusRing(graphics, inner, InnerCorner);
 }
 
-juce::Colour disabledInk()
+juce::Colour disabledInk(bool isBeneath)
 {
-    return toColour(Palette::text).withAlpha(0.7F);
+    return toColour(Palette::text).withAlpha(isBeneath ? DisabledOpacity : 0.7F);
 }
 
 void drawFocusRing(juce::Graphics& graphics, juce::Rectangle<float> area, float cornerSize)

@@ -12,8 +12,9 @@ struct ButtonTile {
     juce::Colour top;
     juce::Colour bottom;
     bool isEnabled = true;
-    bool hasFocus = false; ///< a ring inside of the edge
-    bool isOn = false;     ///< a dark bar at the lower edge, for those who can't tell the colours apart
+    bool isBeneath = false; ///< all around it is disabled, too
+    bool hasFocus = false;  ///< a ring inside of the edge
+    bool isOn = false;      ///< a dark bar at the lower edge, for those who can't tell the colours apart
 
     /// The tile of a button that is neither on nor pressed.
     static ButtonTile normal();
@@ -30,8 +31,15 @@ inline float opacityOf(const juce::Component& component)
 {
     return component.isEnabled() ? 1.0F : DisabledOpacity;
 }
-/// The text or picture of a disabled button, which can still be read.
-juce::Colour disabledInk();
+/// The text or picture of a disabled button. It can still be read, but not where all around it is disabled, too, as beneath a
+/// sheet: it must not stand out there.
+juce::Colour disabledInk(bool isBeneath);
+/// Whether all around a component is disabled.
+inline bool isBeneath(const juce::Component& component)
+{
+    const juce::Component* const parent = component.getParentComponent();
+    return parent && !parent->isEnabled();
+}
 /// What lies over a disabled input.
 inline constexpr juce::uint32 DisabledShade = 0x82606060;
 /// How much darker the lower end of a lit tile is, and the dimmed phase of a flashing button.

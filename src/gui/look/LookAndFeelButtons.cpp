@@ -46,6 +46,7 @@ void LookAndFeel::drawButtonBackground(juce::Graphics& graphics, juce::Button& b
         }
         ButtonTile tile = tileOf(button, isDown);
         tile.isEnabled = button.isEnabled();
+        tile.isBeneath = isBeneath(button);
         tile.isOn = button.getToggleState();
         tile.hasFocus = button.hasKeyboardFocus(false);
         tile.draw(graphics, button.getLocalBounds().toFloat());
@@ -62,7 +63,7 @@ void LookAndFeel::drawButtonText(juce::Graphics& graphics, juce::TextButton& but
     guardSystem([&] {
         const int colour =
             button.getToggleState() ? juce::TextButton::textColourOnId : juce::TextButton::textColourOffId;
-        graphics.setColour(button.isEnabled() ? button.findColour(colour) : disabledInk());
+        graphics.setColour(button.isEnabled() ? button.findColour(colour) : disabledInk(isBeneath(button)));
         graphics.setFont(getTextButtonFont(button, button.getHeight()));
         graphics.drawFittedText(button.getButtonText(), button.getLocalBounds().reduced(3, 0),
                                 juce::Justification::centred, 1, Squeezing);

@@ -3,6 +3,7 @@
 #include "gui/look/PictureButton.h"
 
 #include "gui/guard/Guard.h"
+#include "gui/look/ButtonTile.h"
 
 namespace cadrel::gui {
 
@@ -15,7 +16,9 @@ void PictureButton::setTooltip(const juce::String& tooltip)
 
 void PictureButton::paintButton(juce::Graphics& graphics, bool, bool isDown)
 {
-    guardSystem([&] { m_picture.draw(graphics, getLocalBounds(), {isDown, isEnabled(), hasKeyboardFocus(false)}); });
+    guardSystem([&] {
+        m_picture.draw(graphics, getLocalBounds(), {isDown, isEnabled(), hasKeyboardFocus(false), isBeneath(*this)});
+    });
 }
 
 } // namespace cadrel::gui

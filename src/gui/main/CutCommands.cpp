@@ -6,6 +6,8 @@
 #include "core/model/DataModel.h"
 #include "core/model/DataModelCommandCreator.h"
 #include "core/model/ListOfKind.h"
+#include "core/protect/ProtectedRun.h"
+#include "core/settings/VfxNameMatcher.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ShownText.h"
 #include "util/FilledText.h"
@@ -49,12 +51,16 @@ std::wstring eventText(const GenerationFailure& failure)
     return text;
 }
 
-std::wstring failureText(Result::Type result)
+std::wstring failureText(Result::Type result, const DataModel& model)
 {
+    const std::wstring start = translated(L"No Change EDL could be made.") + L"\n";
+    const std::wstring obstacle = CutCommands::obstacleOfNames(model);
+    if (!obstacle.empty())
+        return start + obstacle;
     try {
         throw result;
     } catch (...) {
-        return translated(L"No Change EDL could be made.") + L"\n" + translated(Guard::messageOfFailure());
+        return start + translated(Guard::messageOfFailure());
     }
 }
 
@@ -86,13 +92,29 @@ std::wstring CutCommands::generate(DataModel& model)
     const auto command = core::createDataModelCommand(translated(L"Generate Change EDL"));
     const Result::Type result = model.generateChangeEdl(passOver);
     if (result != Result::Ok)
-        return failureText(result);
+        return failureText(result, model);
     std::wstring told;
     if (model.changeEdl().isEmpty())
         told = translated(L"Nothing of the old cut survives in the new one. See that both are of one reel.");
     if (passedOver > 0)
         told += (told.empty() ? L"" : L"\n") + passedOverText(passedOver, first);
     return told;
+}
+
+std::wstring CutCommands::obstacleOfNames(const DataModel& model)
+{
+    try {
+        core::VfxNameMatcher().compileEnabled(model.settings().vfxPatterns());
+        return {};
+    } catch (Result::Type) {
+        return translated(L"A VFX name of the settings can't be used. Correct it there.");
+    }
+}
+
+std::wstring CutCommands::obstacleOfRun(const DataModel& model)
+{
+    const bool isGiven = core::ProtectedRun::sourceOf(model) == core::ProtectedRun::Source::Given;
+    return isGiven ? std::wstring() : obstacleOfNames(model);
 }
 
 } // namespace cadrel::gui

@@ -301,13 +301,19 @@ void MainControls::paintPanel(juce::Graphics& graphics, std::int32_t listKind) c
     graphics.fillRect(toRectangle(places.band(listKind)));
 }
 
+/// The window around is enabled then.
+bool MainControls::isBeneathSheet() const
+{
+    return !isEnabled() && getParentComponent() && getParentComponent()->isEnabled();
+}
+
 void MainControls::paintOverChildren(juce::Graphics& graphics)
 {
     guardSystem([&] {
         for (const std::int32_t listKind : Lists) {
             const juce::String& hint = m_hints.at(static_cast<std::size_t>(listKind));
             const juce::Rectangle<int> table = toRectangle(layout().table(listKind));
-            if (!hint.isEmpty()) {
+            if (!hint.isEmpty() && !isBeneathSheet()) {
                 graphics.setColour(toColour(Palette::text).withAlpha(opacityOf(*this)));
                 graphics.setFont(getFont(HintFont));
                 graphics.drawFittedText(hint, table.reduced(HintMargin, HintMargin), juce::Justification::centred, 3);

@@ -70,6 +70,7 @@ private:
     void addInOrder();
     void setUpToggles();
     void paintPanel(juce::Graphics& graphics, std::int32_t listKind) const;
+    bool isBeneathSheet() const;
     void setDropTarget(std::optional<std::int32_t> listKind);
     std::optional<std::int32_t> listAt(juce::Point<int> place) const;
     MainLayout layout() const { return {getWidth(), getHeight()}; }

@@ -10,14 +10,12 @@
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextNotificationBase.h"
 #include "gui/guard/Guard.h"
-#include "gui/look/ShownText.h"
+#include "gui/main/CutCommands.h"
 #include "gui/picture/VideoProviderBase.h"
-#include "util/Result.h"
 
 namespace cadrel::gui {
 
 using core::ListKind;
-using util::Result;
 
 namespace {
 
@@ -63,6 +61,7 @@ MainGui::~MainGui()
     closeSheets();
     guardSystem([this] { letGoOfModel(); });
     // A child that goes with the keyboard hands it to its parent, which would look for the table that is to have it.
+    giveAwayKeyboardFocus();
     removeAllChildren();
 }
 
@@ -193,13 +192,11 @@ void MainGui::componentVisibilityChanged(juce::Component& component)
     guardUser([this] {
         if (!m_model)
             return;
-        try {
+        const std::wstring obstacle = CutCommands::obstacleOfNames(*m_model);
+        if (obstacle.empty())
             m_model->applyVfxHandling();
-        } catch (Result::Type failure) {
-            if (failure != Result::InvalidArgument)
-                throw;
-            Guard::tell(translated(L"A VFX name of the settings can't be used. Correct it there."));
-        }
+        else
+            Guard::tell(obstacle);
     });
 }
 

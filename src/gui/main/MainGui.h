@@ -7,6 +7,7 @@
 #include "gui/files/FileDialog.h"
 #include "gui/look/LookAndFeel.h"
 #include "gui/main/MainControls.h"
+#include "gui/main/PlannedRun.h"
 #include "gui/settings/SettingsDialog.h"
 #include "gui/table/EventTableModel.h"
 #include "gui/video/NewVideosDialog.h"
@@ -26,12 +27,10 @@ class ActionChangeContext;
 class CadrelerBase;
 class ChangeContextNotificationBase;
 class DataModel;
-class ProtectedRun;
 } // namespace cadrel::core
 
 namespace cadrel::gui {
 
-class KeepQuestion;
 class VideoProviderBase;
 
 /// The window of Cadrel. It shows the model that its notifier names, asks the engine for what is to be done, and draws itself
@@ -119,15 +118,24 @@ private:
         Kept,
         None, ///< there is no run
     };
-    /// Asks the user where there is something to ask, and again where that has changed meanwhile. The run becomes the one that he
-    /// was asked about. None also when no run can begin any more.
-    Protection askForProtection(core::ProtectedRun& run);
-    Protection answerTo(const KeepQuestion& question);
-    /// Whether the run goes on from where the sound stands, or the user wants it nevertheless.
-    bool mayRepeat();
+    /// What the user was asked before a run, and what he wants; empty for what wasn't asked.
+    struct Answers {
+        PlannedRun planned;
+        std::wstring repetition;
+        std::wstring loss;
+        Protection protection = Protection::Plain;
+    };
+    /// False when the model is another one now.
+    bool endPreviewForRun();
+    /// Asks the user one question, or requests the run that he was asked about where nothing is left to ask. True when that was
+    /// all: there is a run, or none can begin any more.
+    bool askOrRequestRun(Answers& answers);
+    Protection answerTo(PlannedRun& planned, const std::wstring& question, bool canKeep);
+    /// Whether the user wants the run though it doesn't go on from where the sound stands.
+    bool mayRepeat(PlannedRun& planned, const std::wstring& question);
     /// The button that the user has pressed, counted from 1; 0 when no run can begin any more.
-    std::int32_t askBeforeRun(const std::wstring& question, const std::vector<const wchar_t*>& buttons);
-    core::ProtectedRun plannedRun() const;
+    std::int32_t askBeforeRun(PlannedRun& planned, const std::wstring& question,
+                              const std::vector<const wchar_t*>& buttons);
     void requestRun(Protection protection, const core::ProtectedRun& run);
     util::Result::Type requestKeptRun(const core::ProtectedRun& run);
     void noteRun();

@@ -107,78 +107,83 @@ void MainGui::start()
         return;
     }
     m_hadFocus = hasKeyboardFocus(true);
+    Answers answers;
+    // The host may let everything change while a box is open, so all is looked at again after each.
+    bool isDone = false;
+    while (!isDone)
+        isDone = !endPreviewForRun() || askOrRequestRun(answers);
+}
+
+/// After a preview the source is chosen again.
+bool MainGui::endPreviewForRun()
+{
     const bool wasPreview = m_model->isPreviewActive();
     if (!stopPreview())
-        return;
+        return false;
     if (wasPreview)
         m_controls.setOn(MainButton::Source, true);
-    if (!mayRepeat())
-        return;
-    core::ProtectedRun run = plannedRun();
-    const Protection protection = askForProtection(run);
-    if (protection != Protection::None)
-        requestRun(protection, run);
+    return true;
 }
 
-core::ProtectedRun MainGui::plannedRun() const
+bool MainGui::askOrRequestRun(Answers& answers)
 {
-    return {*m_model, m_engine->getMaterial(), core::ProtectedRun::sourceOf(*m_model)};
-}
-
-MainGui::Protection MainGui::askForProtection(core::ProtectedRun& run)
-{
-    Protection answer = Protection::Plain;
-    std::wstring asked;
-    for (;;) {
-        const KeepQuestion question(run, core::Timecode::framerate());
-        const std::wstring text = question.text();
-        if (!question.isNeeded())
-            return Protection::Plain;
-        // The user has answered what is to be asked now.
-        if (text == asked)
-            return answer;
-        answer = answerTo(question);
-        if (answer == Protection::None)
-            return answer;
-        asked = text;
-        // List and material may have changed while he was asked.
-        run = plannedRun();
+    const std::wstring obstacle = CutCommands::obstacleOfRun(*m_model);
+    if (!obstacle.empty()) {
+        Guard::tell(obstacle);
+        return true;
     }
+    const std::wstring repetition = answers.planned.repetition(*m_model);
+    if (!repetition.empty() && repetition != answers.repetition) {
+        answers.repetition = repetition;
+        return !mayRepeat(answers.planned, repetition);
+    }
+    const core::ProtectedRun& run = answers.planned.run(*m_model, m_engine->getMaterial());
+    const KeepQuestion question(run, core::Timecode::framerate());
+    const std::wstring loss = question.isNeeded() ? question.text() : std::wstring();
+    if (!loss.empty() && loss != answers.loss) {
+        answers.loss = loss;
+        answers.protection = answerTo(answers.planned, loss, question.canKeep());
+        return answers.protection == Protection::None;
+    }
+    requestRun(loss.empty() ? Protection::Plain : answers.protection, run);
+    return true;
 }
 
-MainGui::Protection MainGui::answerTo(const KeepQuestion& question)
+MainGui::Protection MainGui::answerTo(PlannedRun& planned, const std::wstring& question, bool canKeep)
 {
     // The first button is the one that Return presses.
-    using Answers = std::vector<std::pair<const wchar_t*, Protection>>;
-    const Answers answers =
-        question.canKeep()
-            ? Answers{{L"Keep", Protection::Kept}, {L"Don't Keep", Protection::Plain}, {L"Cancel", Protection::None}}
-            : Answers{{L"Cancel", Protection::None}, {L"Don't Keep", Protection::Plain}};
+    using Choices = std::vector<std::pair<const wchar_t*, Protection>>;
+    const Choices choices =
+        canKeep
+            ? Choices{{L"Keep", Protection::Kept}, {L"Don't Keep", Protection::Plain}, {L"Cancel", Protection::None}}
+            : Choices{{L"Cancel", Protection::None}, {L"Don't Keep", Protection::Plain}};
     std::vector<const wchar_t*> buttons;
-    for (const auto& [button, protection] : answers)
+    for (const auto& [button, protection] : choices)
         buttons.push_back(button);
-    const std::int32_t pressed = askBeforeRun(question.text(), buttons);
-    return pressed == 0 ? Protection::None : answers[static_cast<std::size_t>(pressed) - 1].second;
+    const std::int32_t pressed = askBeforeRun(planned, question, buttons);
+    return pressed == 0 ? Protection::None : choices[static_cast<std::size_t>(pressed) - 1].second;
 }
 
-bool MainGui::mayRepeat()
+bool MainGui::mayRepeat(PlannedRun& planned, const std::wstring& question)
 {
-    const std::wstring question = RepeatQuestion::text(*m_model);
-    if (question.empty())
-        return true;
     constexpr std::int32_t StartAnyway = 2;
-    return askBeforeRun(question, {L"Cancel", L"Start Anyway"}) == StartAnyway;
+    return askBeforeRun(planned, question, {L"Cancel", L"Start Anyway"}) == StartAnyway;
 }
 
-std::int32_t MainGui::askBeforeRun(const std::wstring& question, const std::vector<const wchar_t*>& buttons)
+std::int32_t MainGui::askBeforeRun(PlannedRun& planned, const std::wstring& question,
+                                   const std::vector<const wchar_t*>& buttons)
 {
     const juce::Component::SafePointer<MainGui> self(this);
     const core::DataModel* const model = m_model;
+    planned.remember(*m_model);
     const std::int32_t pressed = AlertWindowBase::instance().show(question, buttons[0], buttons[1],
                                                                   buttons.size() > 2 ? buttons[2] : std::wstring());
     const bool isSame = self && m_model == model && m_model && isEnabled() && m_controls.isEnabled();
     const bool isButton = pressed >= 1 && pressed <= static_cast<std::int32_t>(buttons.size());
-    return isSame && isButton && m_engine->canStart() == Result::Ok ? pressed : 0;
+    if (!isSame || !isButton || m_engine->canStart() != Result::Ok)
+        return 0;
+    planned.lookAgain(*m_model);
+    return pressed;
 }
 
 /// The sound stands in the new cut as it is.

@@ -197,8 +197,8 @@ TEST_F(PastRunsTest, BytesOfAnotherVersionAreNoRuns)
     ++bytes.front();
 
     PastRuns read({0, {}, FrameASecond});
-    read.read(bytes);
 
+    EXPECT_FALSE(read.read(bytes));
     EXPECT_TRUE(read.isEmpty());
 }
 
@@ -209,8 +209,8 @@ TEST_F(PastRunsTest, RunsReadBackFromTheirBytesSayTheSame)
     m_runs.add(reelAt(3000).list(), Film().at(3000).shot("X", 0, 150).list(), EventList(), {3000, 3050});
 
     PastRuns read({0, {}, FrameASecond});
-    read.read(m_runs.toBytes());
 
+    EXPECT_TRUE(read.read(m_runs.toBytes()));
     EXPECT_EQ(read.size(), 3U);
     EXPECT_EQ(read.firstDifference(reelAt(1000).list()), 1150);
     EXPECT_EQ(read.firstDifference(reelAt(3000).list()), 3000);
@@ -226,7 +226,7 @@ TEST_F(PastRunsTest, BytesThatAreDamagedAreNoRuns)
 
     for (std::size_t length = 0; length < bytes.size(); ++length) {
         PastRuns read({0, {}, FrameASecond});
-        read.read(bytes.substr(0, length));
+        EXPECT_FALSE(read.read(bytes.substr(0, length))) << length;
         EXPECT_TRUE(read.isEmpty()) << length;
     }
 }

@@ -40,6 +40,8 @@ Lines runsOf(const EventList& events, const Framerate& framerate = FrameASecond)
     Lines lines;
     for (const PictureRun& run : line.runs())
         lines.push_back(linesOf(core::FrameRanges{run.frames}).front() + " x" + std::to_string(run.layerCount));
+    // No name is needed to tell where there is a picture.
+    EXPECT_EQ(core::litFrames(events, framerate), line.lit());
     return lines;
 }
 

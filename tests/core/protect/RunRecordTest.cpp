@@ -37,6 +37,7 @@ constexpr std::int32_t TenSecondsIn = 90250;
 ///     third     |-- A --|---- B ----|-- N --|
 class RunRecordTest : public testing::Test {
 protected:
+    RunRecordTest() { m_earlier.add(makeEvent("X009", "05:00:00:00", "05:00:05:00", "05:00:10:00", "05:00:15:00")); }
     static void setFirst(EventList& list) { setShots(list, "10:00:10:00", "01:00:10:00", "01:00:20:00"); }
     static void setSecond(EventList& list) { setShots(list, "10:00:08:00", "01:00:08:00", "01:00:18:00"); }
     static void setThird(EventList& list)
@@ -65,9 +66,25 @@ protected:
     NextRun nextRun() const { return {m_model, ProtectedRun::sourceOf(m_model)}; }
     PastRuns noted() const { return RunRecord::find(m_model).value(); }
     void setNote(const Variant& note) { m_model.setProperty(PropertyKey::DoneRuns, note); }
+    std::string note() const { return property(PropertyKey::DoneRuns); }
+    std::string property(PropertyKey::Type key) const
+    {
+        Variant stored;
+        EXPECT_EQ(m_model.getProperty(key, stored), util::Result::Ok);
+        return stored.toText();
+    }
+    void setBadVfxName() { m_model.settings().setVfxPattern({"A/B", "", true}, 0); }
+    /// As older versions did: all runs but the last one. Five seconds have moved to 05:00:10:00.
+    void noteEarlierRun()
+    {
+        PastRuns earlier({0, {}, m_project.framerate});
+        earlier.add(EventList(), EventList(), m_earlier);
+        m_model.setProperty(PropertyKey::EarlierRuns, Variant(earlier.toBytes()));
+    }
 
     TestProject m_project;
     DataModel m_model;
+    EventList m_earlier;
 
 private:
     static void setShots(EventList& list, const char* endOfA, const char* cut, const char* end)
@@ -182,19 +199,62 @@ TEST_F(RunRecordTest, TheNoteComesAndGoesWithTheStateOfTheModel)
     EXPECT_FALSE(RunRecord::find(m_model));
 }
 
-TEST_F(RunRecordTest, ANoteThatCannotBeReadIsNoneAndTheNextRunIsNoted)
+TEST_F(RunRecordTest, ANoteThatCannotBeReadIsNoneAndIsLeftAlone)
 {
     run(setFirst, setSecond);
-    Variant good;
-    ASSERT_EQ(m_model.getProperty(PropertyKey::DoneRuns, good), util::Result::Ok);
-    const std::string bytes = good.toText();
-    for (const Variant& bad : {Variant(""), Variant("x"), Variant(std::int32_t{7}), Variant(1.5), Variant(true),
-                               Variant(bytes.substr(0, bytes.size() - 1)), Variant(std::string(300, '\xff'))}) {
+    const std::string bytes = note();
+    std::string laterVersion = bytes;
+    ++laterVersion.front();
+    for (const Variant& bad :
+         {Variant(""), Variant("x"), Variant(std::int32_t{7}), Variant(1.5), Variant(true),
+          Variant(bytes.substr(0, bytes.size() - 1)), Variant(std::string(300, '\xff')), Variant(laterVersion)}) {
         setNote(bad);
         EXPECT_FALSE(RunRecord::find(m_model));
         run(setFirst, setSecond);
-        EXPECT_EQ(noted().size(), 1U);
+        EXPECT_EQ(note(), bad.toText());
+        RunRecord::write(RunRecord::findOrGuess(m_model, PastRuns::AllTime), m_model);
+        EXPECT_EQ(note(), bad.toText());
     }
+}
+
+TEST_F(RunRecordTest, ANoteIsReadWhateverTheVfxNamesOfTheSettingsAre)
+{
+    run(setFirst, setSecond);
+    const std::string bytes = note();
+    setBadVfxName();
+
+    EXPECT_EQ(noted().size(), 1U);
+    EXPECT_EQ(noted().toBytes(), bytes);
+    // Only the comparison of two cuts needs the names.
+    EXPECT_THROW(nextRun().firstDifference(noted()), util::Result::Type);
+    EXPECT_TRUE(NextRun(m_model, Source::Given).hasBeenDone(noted()));
+}
+
+TEST_F(RunRecordTest, RunsAreNotedWhateverTheVfxNamesOfTheSettingsAre)
+{
+    run(setFirst, setSecond);
+    setBadVfxName();
+    m_model.newEdl().clear();
+    m_model.changeEdl().clear();
+    m_model.changeEdl().add(makeEvent("X009", "05:00:00:00", "05:00:05:00", "05:00:10:00", "05:00:15:00"));
+    RunRecord::addRun(m_model, PastRuns::AllTime);
+    EXPECT_TRUE(nextRun().hasBeenDone(noted()));
+    m_model.settings().setVfxPattern({}, 0);
+    setCuts(setFirst, setThird);
+
+    EXPECT_EQ(noted().size(), 2U);
+    EXPECT_EQ(nextRun().firstDifference(noted()), TenSecondsIn - 2 * 25);
+}
+
+// At another rate a list may have no extent, so that any run would hide it.
+TEST_F(RunRecordTest, ReadingForgetsNoRun)
+{
+    m_model.changeEdl().add(makeEvent("X009", "05:00:00:24", "05:00:05:24", "05:00:10:24", "05:00:15:24"));
+    RunRecord::addRun(m_model, PastRuns::AllTime);
+    run(setFirst, setSecond);
+    const TestProject filmRate(core::Framerate(24, 0));
+
+    EXPECT_EQ(noted().size(), 2U);
 }
 
 TEST_F(RunRecordTest, AnEmptyRunIsNotNoted)
@@ -225,19 +285,36 @@ TEST_F(RunRecordTest, ANoteCountsMoreThanTheLists)
 
 TEST_F(RunRecordTest, RunsBeforeTheLastOneAreFoundWhereOlderVersionsKeptThem)
 {
-    PastRuns earlier({0, {}, m_project.framerate});
-    EventList moved;
-    moved.add(makeEvent("X009", "05:00:00:00", "05:00:05:00", "05:00:10:00", "05:00:15:00"));
-    earlier.add(EventList(), EventList(), moved);
-    m_model.setProperty(PropertyKey::EarlierRuns, Variant(earlier.toBytes()));
+    noteEarlierRun();
     setCuts(setFirst, setSecond);
 
+    EXPECT_EQ(noted().size(), 1U);
+    EXPECT_TRUE(noted().haveCarriedOut(m_earlier, true));
     const PastRuns guessed = RunRecord::findOrGuess(m_model, PastRuns::AllTime);
     EXPECT_EQ(guessed.size(), 2U);
-    EXPECT_TRUE(guessed.haveCarriedOut(moved, true));
+    EXPECT_TRUE(guessed.haveCarriedOut(m_earlier, true));
     RunRecord::write(guessed, m_model);
     EXPECT_FALSE(m_model.hasProperty(PropertyKey::EarlierRuns));
     EXPECT_EQ(noted().size(), 2U);
+}
+
+TEST_F(RunRecordTest, TheNextRunIsNotedAfterThoseThatOlderVersionsKept)
+{
+    noteEarlierRun();
+    run(setFirst, setSecond);
+
+    EXPECT_FALSE(m_model.hasProperty(PropertyKey::EarlierRuns));
+    EXPECT_EQ(noted().size(), 2U);
+    EXPECT_TRUE(noted().haveCarriedOut(m_earlier, true));
+}
+
+TEST_F(RunRecordTest, WhatAnOlderVersionKeptAndCannotBeReadIsLeftAloneBesideANewNote)
+{
+    m_model.setProperty(PropertyKey::EarlierRuns, Variant("x"));
+    run(setFirst, setSecond);
+
+    EXPECT_EQ(property(PropertyKey::EarlierRuns), "x");
+    EXPECT_EQ(noted().size(), 1U);
 }
 
 } // namespace cadrel::tests

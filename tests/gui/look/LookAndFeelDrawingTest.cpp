@@ -2,8 +2,10 @@
 
 #include "gui/look/ButtonTile.h"
 #include "gui/look/LookAndFeel.h"
+#include "gui/look/PictureButton.h"
 #include "gui/look/Text.h"
 #include "gui/table/EventColumn.h"
+#include "tests/support/window/FocusedWindow.h"
 #include "tests/support/window/WindowOnScreen.h"
 
 #include <gtest/gtest.h>
@@ -11,6 +13,7 @@
 #include <algorithm>
 #include <cmath>
 #include <functional>
+#include <initializer_list>
 
 using namespace cadrel::gui;
 
@@ -201,7 +204,34 @@ TEST_F(LookAndFeelDrawingTest, LetsTheTextOfADisabledButtonBeReadOnEachGround)
         button.paintEntireComponent(graphics, true);
         const juce::Colour tile = image.getPixelAt(6, 12);
 
-        EXPECT_GE(contrastOf(tile, tile.overlaidWith(disabledInk())), 3.0) << tile.toString();
+        EXPECT_GE(contrastOf(tile, tile.overlaidWith(disabledInk(false))), 3.0) << tile.toString();
+    }
+}
+
+TEST_F(LookAndFeelDrawingTest, DimsButtonsMoreWhereAllAroundThemIsDisabled)
+{
+    juce::Component parent;
+    parent.setSize(80, 24);
+    juce::TextButton text("HHHHH");
+    PictureButton picture("bin", ButtonPicture::Symbol::Bin);
+    for (juce::Button* const button : std::initializer_list<juce::Button*>{&text, &picture}) {
+        parent.addAndMakeVisible(*button);
+        button->setBounds(parent.getLocalBounds());
+        button->setEnabled(false);
+        const auto lightest = [&] {
+            const juce::Image image = parent.createComponentSnapshot(parent.getLocalBounds());
+            float light = 0.0F;
+            for (int x = 4; x < 76; ++x) {
+                for (int y = 4; y < 20; ++y)
+                    light = std::max(light, image.getPixelAt(x, y).getBrightness());
+            }
+            return light;
+        };
+        const float alone = lightest();
+        parent.setEnabled(false);
+        EXPECT_LT(lightest(), alone - 0.1F);
+        parent.setEnabled(true);
+        parent.removeChildComponent(button);
     }
 }
 
@@ -358,6 +388,8 @@ TEST_F(LookAndFeelDrawingTest, DrawsALabelsGroundAndOutlineAndItsTextWhileNobody
     label.setEnabled(false);
     EXPECT_NEAR(greenest(), 128, 8);
     label.setEnabled(true);
+    cadrel::tests::FocusedWindow window(80, 20);
+    window.addAndMakeVisible(label);
     label.showEditor();
     EXPECT_EQ(greenest(), 0);
 }

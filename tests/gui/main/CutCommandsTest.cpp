@@ -100,7 +100,8 @@ TEST_F(CutCommandsTest, TellWhyNoChangeEdlCouldBeMade)
     add(m_model.newEdl(), "A001");
     m_model.settings().setVfxPattern({"(", "", true}, 0);
 
-    EXPECT_EQ(CutCommands::generate(m_model), L"No Change EDL could be made.\nThis could not be carried out.");
+    EXPECT_EQ(CutCommands::generate(m_model),
+              L"No Change EDL could be made.\nA VFX name of the settings can't be used. Correct it there.");
     EXPECT_TRUE(m_model.changeEdl().isEmpty());
     EXPECT_EQ(m_undo.entries, Names{L"Generate Change EDL"});
 }

@@ -532,10 +532,18 @@ TEST_F(MainGuiChangesTest, LeaveAListThatTheWindowDoesNotKnowAlone)
 {
     showThree();
     select("Change", {1});
+    click("new component");
+    m_engine.calls.clear();
+    // Nobody tells of these changes, so that it would show if the window took the number for one of its lists.
+    m_model.setNotifier(nullptr);
+    for (const int kind : {0, 1, 2})
+        list(kind).clear();
+    m_model.setNotifier(&m_notifier);
     for (const std::int32_t unknown : {-1, 3}) {
         notify(EventListChangeContext(unknown));
         EXPECT_EQ(counters("old") + ", " + counters("new") + ", " + counters("change"), "3 0 0, 3 0 0, 3 1 0");
         EXPECT_EQ(timeline(), "selected selected ");
+        EXPECT_TRUE(preview().getToggleState());
     }
     EXPECT_EQ(m_engine.calls, Calls());
     EXPECT_EQ(m_alerts.messages, Texts());

@@ -165,6 +165,40 @@ TEST_F(MainGuiTest, HasTheTextsOfItsControls)
     }
 }
 
+TEST_F(MainGuiTest, CountsTheInvalidEventsInGreenBeforeThereIsAnyModel)
+{
+    const gui::MainControls controls([](std::int32_t, const std::vector<std::string>&) {});
+
+    for (const std::string list : {"old", "new", "change"})
+        EXPECT_EQ(find<juce::Label>(controls, list + "EdlInvalidEventsValue").findColour(juce::Label::textColourId),
+                  juce::Colour(0xff00ff00));
+}
+
+TEST_F(MainGuiTest, ShowsNoHintBeneathASheet)
+{
+    const auto hasHint = [this](const std::string& name) {
+        const juce::Rectangle<int> middle = table(name).getBounds().withSizeKeepingCentre(200, 40);
+        const juce::Image image = controls().createComponentSnapshot(middle);
+        for (int x = 0; x < image.getWidth(); ++x) {
+            for (int y = 0; y < image.getHeight(); ++y) {
+                if (image.getPixelAt(x, y).getBrightness() > 0.35F)
+                    return true;
+            }
+        }
+        return false;
+    };
+    EXPECT_FALSE(hasHint("Old"));
+    EXPECT_TRUE(hasHint("Change")); // that no project is open
+    activate();
+    EXPECT_TRUE(hasHint("Old"));
+    EXPECT_TRUE(hasHint("Change"));
+    click("Settings Button");
+    EXPECT_FALSE(hasHint("Old"));
+    EXPECT_FALSE(hasHint("Change"));
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_TRUE(hasHint("Old"));
+}
+
 TEST_F(MainGuiTest, BeginsWithItsTogglesInTheirFirstState)
 {
     EXPECT_TRUE(button("m_videoLeftToggle").getToggleState());
@@ -1416,6 +1450,47 @@ TEST_F(MainGuiProtectionTest, AsksAgainWhenNothingCanBeKeptAfterTheQuestion)
     EXPECT_EQ(list(ListKind::Change).size(), 1U);
 }
 
+TEST_F(MainGuiProtectionTest, AsksWhetherToRepeatARunThatHasBeenDoneDuringTheQuestion)
+{
+    showGivenList();
+    m_alerts.meanwhile = [this] { core::RunRecord::addRun(m_model, core::PastRuns::AllTime); };
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 2U);
+    EXPECT_EQ(m_alerts.messages[1].substr(0, 61), L"This Change EDL has been carried out in the project already.\n");
+    // The first button of the second question is the one that changes nothing.
+    EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiProtectionTest, EndsAPreviewThatHasComeOnDuringTheQuestion)
+{
+    showGenerated();
+    click("Destination Toggle");
+    m_alerts.meanwhile = [this] {
+        m_model.setPreviewActive(true);
+        m_model.notifyPreviewState();
+    };
+    click("Cadrel Button");
+
+    // Else the change of the list would end it, and drop the run.
+    EXPECT_EQ(m_engine.calls, (Calls{"off", "run 3608..3620"}));
+    EXPECT_FALSE(m_model.isPreviewActive());
+    EXPECT_TRUE(source().getToggleState());
+    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
+    EXPECT_FALSE(m_gui->isEnabled());
+}
+
+TEST_F(MainGuiProtectionTest, StartsNoRunOfCutsWhoseNamesCannotBeCompared)
+{
+    showGenerated();
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_engine.calls, Calls());
+    EXPECT_EQ(m_alerts.messages, Texts{L"A VFX name of the settings can't be used. Correct it there."});
+    EXPECT_TRUE(m_gui->isEnabled());
+}
+
 TEST_F(MainGuiProtectionTest, OffersToLeaveItWhereNothingCanBeKept)
 {
     showLateReel();
@@ -1494,6 +1569,50 @@ TEST_F(MainGuiRepeatTest, StartsNoRunWhenTheUserClosesTheQuestion)
     }
 
     EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiRepeatTest, AsksWhateverTheVfxNamesOfTheSettingsAre)
+{
+    m_model.settings().setVfxPattern({"(", "", true}, 0);
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_alerts.messages[0].substr(0, 61), L"This Change EDL has been carried out in the project already.\n");
+    EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiRepeatTest, AsksOfRunsThatAnOlderVersionHasNoted)
+{
+    m_model.setProperty(PropertyKey::EarlierRuns, core::Variant(property(PropertyKey::DoneRuns)));
+    m_model.removeProperty(PropertyKey::DoneRuns);
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_alerts.messages.size(), 1U);
+    EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiRepeatTest, AsksAgainWhenTheSoundStandsInAnotherCutAfterTheQuestion)
+{
+    m_alerts.answer = 2;
+    m_alerts.meanwhile = [this] {
+        // The sound stands in the cut of a shot that isn't the one of the old cut now.
+        list(ListKind::Old).add(makeEvent("A001", "10:00:00:00", "10:00:15:00", "01:00:00:00", "01:00:15:00"));
+        list(ListKind::New).add(makeEvent("B002", "10:00:00:00", "10:00:15:00", "01:00:00:00", "01:00:15:00"));
+        core::RunRecord::addRun(m_model, core::PastRuns::AllTime);
+    };
+    click("Cadrel Button");
+
+    ASSERT_EQ(m_alerts.messages.size(), 2U);
+    EXPECT_EQ(m_alerts.messages[1].substr(0, 46), L"The Old EDL isn't the cut of the last run. The");
+}
+
+TEST_F(MainGuiRepeatTest, EndsAPreviewThatHasComeOnDuringTheQuestion)
+{
+    m_alerts.answer = 2;
+    m_alerts.meanwhile = [this] { m_model.setPreviewActive(true); };
+    click("Cadrel Button");
+
+    EXPECT_EQ(m_engine.calls, (Calls{"off", "run"}));
 }
 
 TEST_F(MainGuiRepeatTest, AsksThenAlsoWhatIsToBeKept)

@@ -69,6 +69,17 @@ TEST_F(RepeatQuestionTest, TellsWhereTheSoundStandsInAnotherCut)
                   Consequence);
 }
 
+TEST_F(RepeatQuestionTest, TellsTheSameOfRunsThatAnOlderVersionHasNoted)
+{
+    run();
+    core::Variant note;
+    ASSERT_EQ(m_model.getProperty(PropertyKey::DoneRuns, note), util::Result::Ok);
+    m_model.removeProperty(PropertyKey::DoneRuns);
+    m_model.setProperty(PropertyKey::EarlierRuns, note);
+
+    EXPECT_NE(text(m_model), L"");
+}
+
 TEST_F(RepeatQuestionTest, AsksNothingOfTheRunThatGoesOn)
 {
     run();

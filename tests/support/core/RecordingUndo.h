@@ -2,7 +2,9 @@
 
 #pragma once
 
+#include "core/model/DataModel.h"
 #include "core/model/DataModelCommandCreator.h"
+#include "core/serialize/ByteArchive.h"
 #include "util/Result.h"
 
 #include <memory>
@@ -25,6 +27,10 @@ public:
         if (failure != util::Result::Ok)
             throw failure;
         begun.push_back(name);
+        if (model) {
+            before.clear();
+            before << *model;
+        }
         return std::make_unique<Command>(name, *this);
     }
     std::unique_ptr<core::DataModelChangeCommand> createCommand(core::EditTransactionHandle&) override
@@ -37,6 +43,8 @@ public:
         throw std::logic_error("the window opens no transaction");
     }
 
+    const core::DataModel* model = nullptr;        ///< its state is kept at the start of each scope, if it is set
+    core::serialize::ByteArchive before;           ///< that state
     util::Result::Type failure = util::Result::Ok; ///< thrown instead of the next scopes, when it isn't Ok
     std::vector<std::wstring> begun;               ///< scopes that were opened
     std::vector<std::wstring> entries;             ///< scopes that were closed

@@ -17,7 +17,8 @@ class ScreenlessPeer : public juce::ComponentPeer {
 public:
     using ComponentPeer::ComponentPeer;
 
-    void* getNativeHandle() const override { return nullptr; }
+    /// Of no window; JUCE only takes it for one.
+    void* getNativeHandle() const override { return const_cast<ScreenlessPeer*>(this); }
     void setVisible(bool) override {}
     void setTitle(const juce::String&) override {}
     void setBounds(const juce::Rectangle<int>& bounds, bool) override

@@ -43,12 +43,16 @@ private:
         ManagedScreen();
     };
 
+    struct Content : juce::Component {
+        void paint(juce::Graphics& graphics) override { graphics.fillAll(juce::Colours::black); }
+    };
+
     juce::ComponentPeer& peer();
 
     ManagedScreen m_screen;
     juce::ScopedJuceInitialiser_GUI m_juce;
     gui::LookAndFeel m_look;
-    juce::Component m_content;
+    Content m_content;
 };
 
 } // namespace cadrel::tests
