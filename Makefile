@@ -6,6 +6,7 @@
 #   make test           every test; PRESET=asan runs them under the sanitizers
 #   make build          the programs into build/release/bin, the libraries into build/release/lib
 #   make bench          the benchmarks, and the whole program against its bounds
+#   make window         opens the window with the example reel, after its videos have been rendered
 #   make videos         renders the old and the new cut of the example reel, into examples/reel3/Video
 #   make docs-pictures  the pictures of change notes and of the window in docs/pictures
 #   make fuzz           every fuzzer for FUZZ_SECONDS from its corpus
@@ -19,7 +20,7 @@ sources = $(shell find src standin app desktop examples tests bench fuzz -name '
 reel3 = examples/reel3
 picture_tests = cadrel_gui_window_tests cadrel_desktop_tracks_tests
 
-.PHONY: run test build bench videos fuzz pictures docs-pictures format check-format clean
+.PHONY: run window test build bench videos fuzz pictures docs-pictures format check-format clean
 
 run:
 	@cmake/build.sh release cadrel
@@ -31,6 +32,13 @@ run:
 	@echo "Every change, step by step, stands in build/run/reel3_notes.html."
 	@echo "Every move and every marker stands in build/run/reel3_v12.txt, as JSON in build/run/reel3_v12.json."
 	@echo "The project: build/release/bin/cadrel show build/run/reel3_v12.stage"
+
+window: $(reel3)/Video/LW_R3_v12.mov
+	@cmake/build.sh release cadrel cadrel_desktop
+	build/release/bin/cadrel open $(reel3)/reel3.stage
+
+$(reel3)/Video/LW_R3_v12.mov:
+	@$(MAKE) videos
 
 test:
 	@cmake/build.sh $(PRESET)
@@ -54,8 +62,8 @@ videos:
 	build/release/bin/render_reel3 $(reel3)/reel3_v07.edl $(reel3)/Video/LW_R3_v07.mov
 	build/release/bin/render_reel3 $(reel3)/reel3_v12.edl $(reel3)/Video/LW_R3_v12.mov
 
-docs-pictures:
-	@cmake/build.sh release cadrel make_cuts cadrel_module_tests
+docs-pictures: $(reel3)/Video/LW_R3_v12.mov
+	@cmake/build.sh release cadrel make_cuts cadrel_module_tests cadrel_desktop_tests
 	@cmake/install-packages.sh pictures
 	docs/make-pictures.sh build/release/bin
 

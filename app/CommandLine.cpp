@@ -35,6 +35,7 @@ constexpr const char* MainHelp = R"(Examples:
   cadrel notes --old reel3_v07.edl --new reel3_v12.edl -o reel3_notes.html
   cadrel list reel3_v12.edl
   cadrel show reel3.stage
+  cadrel open reel3.stage
 
 Exit status: 0 done, 1 a file or its content stopped the work, 2 wrong usage.)";
 
@@ -101,6 +102,14 @@ Examples:
   cadrel list reel3_v12.edl
   cadrel list --summary *.edl
   cadrel list reel3_change.edl --audio --rate "25 fps" --json -)";
+
+constexpr const char* OpenHelp =
+    R"(The window shows the tracks of the project, and below them Cadrel. It needs a display of the X Window System. The
+program with the window, cadrel-desktop, lies beside this one.
+
+Examples:
+  cadrel open
+  cadrel open reel3.stage reel4.stage)";
 
 constexpr const char* ShowHelp =
     R"(Shows the facts of the project and the tree of its tracks; then what lies on each track, with its times, its clip
@@ -466,6 +475,14 @@ CLI::App* addShow(CLI::App& program, ShowOptions& options)
     return show;
 }
 
+CLI::App* addOpen(CLI::App& program, OpenOptions& options)
+{
+    CLI::App* const open = program.add_subcommand("open", "Open a window to conform in");
+    open->add_option("PROJECT", options.projects, "Projects to open, each in a tab")->type_name("");
+    open->footer(OpenHelp);
+    return open;
+}
+
 std::vector<std::string> commandNames(const CLI::App& program)
 {
     std::vector<std::string> names;
@@ -534,6 +551,7 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
     const CLI::App* const notes = addNotes(program, line.notes);
     const CLI::App* const list = addList(program, line.list);
     const CLI::App* const show = addShow(program, line.show);
+    const CLI::App* const open = addOpen(program, line.open);
 
     try {
         program.parse(argc, argv);
@@ -548,7 +566,7 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
         return std::nullopt;
     }
     if (program.get_subcommands().empty())
-        throw UsageError{"give a command, generate, apply, notes, list or show"};
+        throw UsageError{"give a command, generate, apply, notes, list, show or open"};
     if (apply->parsed() && line.apply.changeFiles.empty() && line.apply.generation.oldFiles.empty())
         throw UsageError{"apply: give the two cuts with --old and --new, or a change EDL with --change"};
     if (apply->parsed())
@@ -559,6 +577,8 @@ std::optional<CommandLine> CommandLine::parse(int argc, char** argv)
         line.command = Command::List;
     else if (show->parsed())
         line.command = Command::Show;
+    else if (open->parsed())
+        line.command = Command::Open;
     return line;
 }
 

@@ -6,6 +6,7 @@
 #include "app/edl/GenerateCommand.h"
 #include "app/edl/ListCommand.h"
 #include "app/notes/NotesCommand.h"
+#include "app/open/OpenCommand.h"
 #include "app/project/ShowCommand.h"
 
 #include <optional>
@@ -14,13 +15,14 @@ namespace cadrel::app {
 
 /// The command line, once parsed.
 struct CommandLine {
-    enum class Command { Generate, Apply, Notes, List, Show };
+    enum class Command { Generate, Apply, Notes, List, Show, Open };
 
     GenerateOptions generate;
     ApplyOptions apply;
     NotesOptions notes;
     ListOptions list;
     ShowOptions show;
+    OpenOptions open;
     Command command = Command::Generate;
 
     /// Prints what `--help` and `--version` ask for, and gives nothing then. Throws UsageError.

@@ -38,6 +38,8 @@ void run(int argc, char** argv, Terminal& terminal)
         line->show.projectFile = app::projectFileIn(line->show.projectFile);
         app::runShow(line->show, terminal);
         break;
+    case CommandLine::Command::Open:
+        app::runOpen(line->open);
     }
 }
 

@@ -13,7 +13,7 @@ case $1 in
 release) needed="$needed libbenchmark-dev" ;;
 asan | fuzz) needed="$needed clang libclang-rt-14-dev" ;;
 tests)
-    needed="chromium poppler-utils ffmpeg fonts-dejavu-core fonts-droid-fallback ardour"
+    needed="chromium poppler-utils ffmpeg fonts-dejavu-core fonts-droid-fallback ardour openbox"
     helpful=""
     ;;
 pictures)

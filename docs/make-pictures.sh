@@ -1,6 +1,6 @@
 #!/bin/sh
 # make-pictures.sh PROGRAMS: takes the notes of the example, of a real reel and of a film of 20 reels with the programs of a build,
-# and lets the test of the example reel take the window. Writes the pictures of them to docs/pictures.
+# and lets tests on the example reel take the window. Writes the pictures of them to docs/pictures.
 set -eu
 cd "$(dirname "$0")/.."
 programs=$1
@@ -49,6 +49,11 @@ page sound 1000 light:1
 for name in add menu preview settings videos; do
     cp "$programs/../window/window-$name.png" "$work/"
 done
-for picture in "$work"/notes-*.png "$work"/window-*.png; do
+# The program with the window.
+"$programs/cadrel_desktop_tests" --gtest_filter='*ConformsAReel*WithoutAWindowManager' >"$work/desktop.log"
+for name in open generated question conformed; do
+    cp "$programs/../window/desktop-$name.png" "$work/"
+done
+for picture in "$work"/notes-*.png "$work"/window-*.png "$work"/desktop-*.png; do
     pngquant --force --strip --output "$pictures/$(basename "$picture")" 192 "$picture"
 done

@@ -6,6 +6,7 @@
 #include "standin/video/VideoError.h"
 #include "standin/video/VideoFile.h"
 
+#include <algorithm>
 #include <chrono>
 #include <cstddef>
 #include <cstdint>
@@ -66,7 +67,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         VideoFile file(bytes.path(), soon());
         const std::uint32_t count = file.frameCount({24, 1});
         check(count > 0, "a video has a frame");
-        for (const std::uint32_t frame : {count - 1, 0U, count / 2, count})
+        // Far from each other, step by step to the front, and past the end.
+        for (const std::uint32_t frame :
+             {count - 1, 0U, count / 2, std::max(count / 2, 1U) - 1, std::max(count / 2, 2U) - 2, count})
             look(file, frame);
     } catch (const VideoError& error) {
         check(*error.what() != '\0', "a reason is told");

@@ -104,6 +104,13 @@ IHostContext* Application::context()
     return m_services->context.get();
 }
 
+void Application::setBoxes(UserBoxes* boxes)
+{
+    alerts().setBoxes(boxes);
+    fileSelector().setBoxes(boxes);
+    progress().setBoxes(boxes);
+}
+
 Project& Application::createProject()
 {
     return add(makeCounted<Project>(edits().log()));

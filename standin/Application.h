@@ -28,6 +28,7 @@ class Project;
 class ProjectManager;
 class Translations;
 class Transport;
+class UserBoxes;
 class VideoSupport;
 class ViewManager;
 class WindowFactoryRegistry;
@@ -47,6 +48,8 @@ public:
     ~Application();
 
     Velmark::IHostContext* context();
+    /// What alerts, file boxes and progress are shown with in place of the terminal. Not owned; null for none.
+    void setBoxes(UserBoxes* boxes);
 
     /// A new, empty project, which is told to the listeners.
     Project& createProject();

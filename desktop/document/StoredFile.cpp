@@ -28,7 +28,9 @@ StoredFile::State StoredFile::look()
     const FileStamp stamp = FileStamp::of(m_path);
     if (!stamp.exists)
         return State::Missing;
-    return stamp == m_stamp ? State::AsStored : compareContent();
+    if (stamp == m_stamp)
+        return State::AsStored;
+    return stamp == m_changedStamp ? State::Changed : compareContent();
 }
 
 StoredFile::State StoredFile::lookInside()
@@ -40,8 +42,10 @@ StoredFile::State StoredFile::compareContent()
 {
     // Before the content, so that what is written while it is read is noticed the next time.
     const FileStamp stamp = FileStamp::of(m_path);
-    if (stamp.size != m_print.size || ContentPrint::ofFile(m_path) != m_print)
+    if (stamp.size != m_print.size || ContentPrint::ofFile(m_path) != m_print) {
+        m_changedStamp = stamp;
         return State::Changed;
+    }
     m_stamp = stamp;
     return State::AsStored;
 }

@@ -23,8 +23,8 @@ public:
     const ContentPrint& print() const { return m_print; }
     const cadrel::util::FileStamp& stamp() const { return m_stamp; }
 
-    /// What the file is now. Its content is read only when it has another size, time or place on the disk; a file that was
-    /// only touched is as it was stored.
+    /// What the file is now. Its content is read only when it has got another size, time or place on the disk since the last
+    /// look; a file that was only touched is as it was stored.
     State look();
     /// The same, but the content is always read: not every program that writes a file leaves a new time.
     State lookInside();
@@ -34,6 +34,7 @@ private:
 
     std::filesystem::path m_path;
     cadrel::util::FileStamp m_stamp;
+    cadrel::util::FileStamp m_changedStamp; ///< with which it had another content
     ContentPrint m_print;
 };
 

@@ -153,7 +153,7 @@ public:
     void writeOut(pugi::xml_node& element, bool isKept, const std::function<SessionId()>& newId) const
     {
         const bool isWhole = m_start + m_length == m_fades.m_region.length && m_out == m_outBegin && m_inEnd <= m_out;
-        if (isKept && (isWhole || m_out == m_length))
+        if (isKept && (isWhole || (m_out == m_length && m_outBegin >= m_length)))
             return;
         write(element, FadeOut, m_out, m_length, m_outBegin >= m_length && m_inEnd <= m_out ? m_tailDip : 0, newId);
     }

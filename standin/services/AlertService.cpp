@@ -2,8 +2,8 @@
 
 #include "standin/services/AlertService.h"
 
-#include <algorithm>
-#include <array>
+#include <string>
+#include <vector>
 
 namespace standin {
 
@@ -14,16 +14,27 @@ int32 AlertService::show(const char16_t* message, const char16_t* button1, const
 {
     constexpr int32 NoButton = 0;
     constexpr int32 FirstButton = 1;
+    constexpr const char16_t* DefaultLabel = u"OK";
     if (!message)
         return NoButton;
-    const std::array<const char16_t*, 3> labels{button1, button2, button3};
-    const auto used = std::find_if(labels.begin(), labels.end(), [](const char16_t* label) { return label; });
-    if (used == labels.end()) {
-        m_terminal.writeMessage(message);
+    std::vector<std::u16string> labels;
+    std::vector<int32> numbers;
+    for (int32 number = FirstButton; const char16_t* const label : {button1, button2, button3}) {
+        if (label) {
+            labels.emplace_back(label);
+            numbers.push_back(number);
+        }
+        ++number;
+    }
+    if (m_boxes && labels.empty()) {
+        m_boxes->ask(message, {DefaultLabel});
         return FirstButton;
     }
-    m_terminal.writeMessage(std::u16string(message) + u" [" + *used + u"]");
-    return FirstButton + static_cast<int32>(used - labels.begin());
+    if (m_boxes)
+        return numbers[m_boxes->ask(message, labels)];
+    m_terminal.writeMessage(labels.empty() ? std::u16string(message)
+                                           : std::u16string(message) + u" [" + labels.front() + u"]");
+    return labels.empty() ? FirstButton : numbers.front();
 }
 
 } // namespace standin

@@ -2,6 +2,7 @@
 
 #pragma once
 
+#include "standin/services/UserBoxes.h"
 #include "velmark/Implements.h"
 #include "velmark/UserInterface.h"
 
@@ -11,7 +12,7 @@
 
 namespace standin {
 
-/// File boxes that nobody sees: each answers the next of the choices that were made beforehand.
+/// File boxes. Without boxes nobody sees them: each answers the next of the choices that were made beforehand.
 class FileSelector : public Velmark::Implements<FileSelector, Velmark::FObject, Velmark::IFileSelector> {
 public:
     static constexpr const char* ClassName = "FileSelector";
@@ -19,6 +20,8 @@ public:
     /// What select answers to arguments that it can't work with.
     static constexpr Velmark::int32 Failed = 2;
 
+    /// Not owned; null for none.
+    void setBoxes(UserBoxes* boxes) { m_boxes = boxes; }
     /// What the user chooses in the next box for which there is no choice yet. No files cancel it.
     void choose(std::vector<std::u16string> files) { m_choices.push_back(std::move(files)); }
 
@@ -28,6 +31,9 @@ public:
                           Velmark::IObjectList* chosen) override;
 
 private:
+    std::vector<std::u16string> nextChoice();
+
+    UserBoxes* m_boxes = nullptr;
     std::deque<std::vector<std::u16string>> m_choices;
 };
 

@@ -96,6 +96,8 @@ int32 ProgressService::end()
     if (!m_operation)
         return ResultFalse;
     m_terminal.eraseProgress();
+    if (m_boxes && m_operation->isVisible)
+        m_boxes->endProgress();
     m_operation.reset();
     return ResultOk;
 }
@@ -104,7 +106,12 @@ void ProgressService::report(bool looksDifferent)
 {
     if (m_operation->cancelled && m_terminal.isInterrupted())
         *m_operation->cancelled = true;
-    if (m_operation->isVisible && looksDifferent)
+    // The box is asked each time, because the user may cancel there at any.
+    if (m_boxes && m_operation->isVisible) {
+        const bool isCancelled = m_boxes->showProgress(m_operation->progress());
+        if (isCancelled && m_operation->cancelled)
+            *m_operation->cancelled = true;
+    } else if (m_operation->isVisible && looksDifferent)
         m_terminal.drawProgress(m_operation->line());
 }
 
@@ -126,6 +133,11 @@ int ProgressService::Operation::percentage() const
         return 100;
     const double part = total > 0 ? static_cast<double>(position) / static_cast<double>(total) : 0.0;
     return std::max(stageStart, std::min(99, stageStart + static_cast<int>((100 - stageStart) * part)));
+}
+
+UserBoxes::Progress ProgressService::Operation::progress() const
+{
+    return {title, text, status, percentage(), cancelled != nullptr};
 }
 
 std::u16string ProgressService::Operation::line() const

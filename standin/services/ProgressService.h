@@ -3,6 +3,7 @@
 #pragma once
 
 #include "standin/services/Terminal.h"
+#include "standin/services/UserBoxes.h"
 #include "velmark/Implements.h"
 #include "velmark/UserInterface.h"
 
@@ -11,20 +12,23 @@
 
 namespace standin {
 
-/// The progress of one operation at a time, as a line on the terminal:
+/// The progress of one operation at a time, as a box or, without boxes, as a line on the terminal:
 ///
 ///     Cadrel:  45% (123 of 270) Processing Project - Generate Markers
 ///
 /// How many stages there will be isn't known, so that each takes what the former ones have left of the hundred.
 ///
-/// The user cancels by interrupting the program: whatever the operation tells of its progress asks for that. All but
-/// `begin` is refused while no operation has begun.
+/// The user cancels in the box, or by interrupting the program: whatever the operation tells of its progress asks for that. All
+/// but `begin` is refused while no operation has begun.
 class ProgressService : public Velmark::Implements<ProgressService, Velmark::FObject, Velmark::IProgressService> {
 public:
     static constexpr const char* ClassName = "ProgressService";
 
     explicit ProgressService(Terminal& terminal) : m_terminal(terminal) {}
     ~ProgressService() override;
+
+    /// Not owned; null for none.
+    void setBoxes(UserBoxes* boxes) { m_boxes = boxes; }
 
     /// Refuses a second operation, and every mode but Modal.
     Velmark::int32 begin(Velmark::int32 mode, const char16_t* title, bool* cancelled) override;
@@ -44,6 +48,7 @@ private:
         void beginStage(Velmark::uint64 steps);
         int percentage() const;
         std::u16string line() const;
+        UserBoxes::Progress progress() const;
 
         std::u16string title;
         std::u16string text;
@@ -59,6 +64,7 @@ private:
     void report(bool looksDifferent = true);
 
     Terminal& m_terminal;
+    UserBoxes* m_boxes = nullptr;
     std::optional<Operation> m_operation;
 };
 

@@ -18,6 +18,8 @@ using Reason = VideoError::Reason;
 namespace {
 
 constexpr std::int64_t NoTime = AV_NOPTS_VALUE;
+/// Times of any film are less, so that sums of a few of them are numbers, too.
+constexpr std::int64_t MostTicks = std::int64_t{1} << 60;
 /// How far the search for a last picture goes back at first, in seconds.
 constexpr int FirstStep = 1;
 
@@ -33,6 +35,12 @@ AvOwner<AVDictionary> decoderOptions()
 bool isFilm(const AVStream& stream)
 {
     return stream.codecpar->codec_type == AVMEDIA_TYPE_VIDEO && (stream.disposition & AV_DISPOSITION_ATTACHED_PIC) == 0;
+}
+
+/// What a file tells, or `unless` when no film has such a time.
+std::int64_t sensible(std::int64_t ticks, std::int64_t unless)
+{
+    return ticks >= -MostTicks && ticks <= MostTicks ? ticks : unless;
 }
 
 bool isPositive(AVRational ratio)
@@ -159,6 +167,9 @@ bool PictureReader::readPacket()
             return false;
         if (m_packet->stream_index != m_stream->index)
             continue;
+        m_packet->pts = sensible(m_packet->pts, NoTime);
+        m_packet->dts = sensible(m_packet->dts, NoTime);
+        m_packet->duration = sensible(m_packet->duration, 0);
         if (!m_waitsForKey)
             return true;
         if ((m_packet->flags & AV_PKT_FLAG_KEY) == 0)
@@ -227,7 +238,7 @@ void PictureReader::restart()
 std::int64_t PictureReader::findEnd()
 {
     const std::int64_t second = std::max<std::int64_t>(1, av_rescale_q(FirstStep, {1, 1}, m_stream->time_base));
-    const std::int64_t start = m_stream->start_time == NoTime ? 0 : m_stream->start_time;
+    const std::int64_t start = sensible(m_stream->start_time, 0);
     const std::int64_t length = toldLength();
     for (std::int64_t back = 0; back < length; back = back == 0 ? second : 2 * back) {
         if (!seek(start + length - back))
@@ -246,9 +257,9 @@ std::int64_t PictureReader::findEnd()
 std::int64_t PictureReader::toldLength() const
 {
     if (m_stream->duration != NoTime)
-        return m_stream->duration;
+        return sensible(m_stream->duration, 0);
     if (m_format->duration != NoTime)
-        return av_rescale_q(m_format->duration, AVRational{1, AV_TIME_BASE}, m_stream->time_base);
+        return sensible(av_rescale_q(m_format->duration, AVRational{1, AV_TIME_BASE}, m_stream->time_base), 0);
     return 0;
 }
 

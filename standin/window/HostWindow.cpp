@@ -94,7 +94,8 @@ void HostWindow::close()
 
 int32 HostWindow::resizeView(IPlugView* view, const ViewRect& rect)
 {
-    if (!m_native || view != m_view.get() || !m_description.isResizable || widthOf(rect) <= 0 || heightOf(rect) <= 0)
+    if (!m_native || view != m_view.get() || !m_description.isResizable || m_native->hasFixedRoom() ||
+        widthOf(rect) <= 0 || heightOf(rect) <= 0)
         return ResultFalse;
     const Counted<IPlugView> held = m_view;
     m_native->setSize(widthOf(rect), heightOf(rect));
@@ -117,6 +118,12 @@ void HostWindow::resizedByUser(int32 width, int32 height)
     if (widthOf(rect) != width || heightOf(rect) != height)
         m_native->setSize(widthOf(rect), heightOf(rect));
     view->onSize({0, 0, widthOf(rect), heightOf(rect)});
+}
+
+void HostWindow::givenRoom(int32 width, int32 height)
+{
+    if (const Counted<IPlugView> view = m_view)
+        view->onSize({0, 0, width, height});
 }
 
 void HostWindow::focusChanged(bool hasFocus)

@@ -35,7 +35,7 @@ public:
     Velmark::int32 setCloseNotification(Velmark::ICloseWindowNotification* listener) override;
     Velmark::int32 show(bool visible) override;
 
-    /// Fails for another view than its own, and where the description allows no other size.
+    /// Fails for another view than its own, and where the description or the window allows no other size.
     Velmark::int32 resizeView(Velmark::IPlugView* view, const Velmark::ViewRect& rect) override;
 
     void idle();
@@ -48,6 +48,7 @@ public:
 private:
     // The view may close the window in each of its calls, and with it give back the last reference.
     void resizedByUser(std::int32_t width, std::int32_t height) override;
+    void givenRoom(std::int32_t width, std::int32_t height) override;
     void closedByUser() override { close(); }
     void focusChanged(bool hasFocus) override;
     void close();

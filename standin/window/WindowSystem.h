@@ -15,6 +15,8 @@ public:
     class Listener {
     public:
         virtual void resizedByUser(std::int32_t width, std::int32_t height) = 0;
+        /// The host has no more room than this, whatever the view would like to have.
+        virtual void givenRoom(std::int32_t width, std::int32_t height) = 0;
         virtual void closedByUser() = 0;
         virtual void focusChanged(bool hasFocus) = 0;
 
@@ -26,6 +28,8 @@ public:
 
     /// What a view is attached to; its kind is WindowSystem::parentType().
     virtual void* parent() = 0;
+    /// Whether its size is the host's alone, so that views may not ask for another one.
+    virtual bool hasFixedRoom() const { return false; }
     /// In physical pixels.
     virtual void setSize(std::int32_t width, std::int32_t height) = 0;
     /// Makes it visible, in front of the others.

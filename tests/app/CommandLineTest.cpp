@@ -37,7 +37,8 @@ TEST(CommandLine, HelpOfEachCommandHasAnExample)
                                                       {"generate", "--help"},
                                                       {"apply", "--help"},
                                                       {"list", "--help"},
-                                                      {"show", "--help"}}) {
+                                                      {"show", "--help"},
+                                                      {"open", "--help"}}) {
         const Outcome outcome = runCadrel(arguments);
 
         EXPECT_EQ(outcome.status, 0);
@@ -48,7 +49,7 @@ TEST(CommandLine, HelpOfEachCommandHasAnExample)
 
 TEST(CommandLine, ACommandIsNeeded)
 {
-    expectWrongUsage({}, "generate, apply, notes, list or show");
+    expectWrongUsage({}, "generate, apply, notes, list, show or open");
     expectWrongUsage({"conform"}, "conform");
 }
 

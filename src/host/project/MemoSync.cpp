@@ -19,6 +19,7 @@
 #include <cmath>
 #include <limits>
 #include <optional>
+#include <tuple>
 #include <utility>
 
 using cadrel::core::SecondsRange;
@@ -247,6 +248,7 @@ public:
     /// The memos have stood as placed.
     void follow(PlacedMemos placed, double previewStart)
     {
+        readMarks(placed, previewStart);
         for (const PlacedMemo& memo : placed.all()) {
             if (isBefore(memo.span.start, previewStart))
                 ++m_counts[memo.id];
@@ -266,6 +268,8 @@ public:
     }
 
 private:
+    /// An id, and a MemoMark's place and name.
+    using MarkOfId = std::tuple<std::int64_t, std::uint32_t, std::uint32_t>;
     /// What the user has done to the copies of a stretch.
     struct Edits {
         const Remembered* remembered; ///< null where nothing is known; then the rest is empty
@@ -304,23 +308,26 @@ private:
             for (const PlacedMemo& copy : each.edited)
                 editedCounts[copy.id] += m_sync.m_notFollowed.contains(memoOf(copy.event)) ? 0 : 1;
         }
-        std::map<std::int64_t, std::pair<Memo, const Stretch*>> left;
         for (std::size_t index = 0; index < edits.size(); ++index) {
+            std::map<std::int64_t, Memo> left;
             for (const Memo& copy : edits[index].gone.rest()) {
                 if (goneCounts[copy.id] == 1 && editedCounts[copy.id] == 1)
-                    left.try_emplace(copy.id, copy, &m_preview.shown[index].stretch);
+                    left.emplace(copy.id, copy);
             }
+            if (!left.empty())
+                findTaken(left, placed, m_preview.shown[index], edits[index].remembered, previewStart);
         }
-        if (left.empty())
-            return;
-        for (const PlacedMemo& memo : placed.all()) {
+    }
+    /// Of the copies that have left a stretch.
+    void findTaken(const std::map<std::int64_t, Memo>& left, const PlacedMemos& placed, const Shown& shown,
+                   const Remembered* remembered, double previewStart)
+    {
+        for (const PlacedMemo& memo : sourcesOf(placed, shown, remembered)) {
             const auto found = left.find(memo.id);
             if (found == left.end() || !isBefore(memo.span.start, previewStart))
                 continue;
-            const auto& [before, stretch] = found->second;
-            if (!liesIn(memo.span, stretch->source))
-                continue;
-            const double distance = std::abs(memo.span.start - stretch->toSource(before.start));
+            const Memo& before = found->second;
+            const double distance = std::abs(memo.span.start - shown.stretch.toSource(before.start));
             const auto [taken, isFirst] = m_taken.try_emplace(memo.id, Taken{before, memo, distance});
             if (!isFirst && distance < taken->second.distance)
                 taken->second = {before, memo, distance};
@@ -347,10 +354,13 @@ private:
         std::erase_if(edits.edited, [&](const PlacedMemo& copy) {
             // One that was there already isn't another that has gone since.
             const Memo now = memoOf(copy.event);
-            if (m_sync.m_notFollowed.contains(now))
-                return hasOneMemo(copy) && carryOver(copy, sources, stretch, std::nullopt);
+            const bool wasThere = m_sync.m_notFollowed.contains(now);
+            const bool isOfMemo = hasOneMemo(copy) && !isPasted(copy, wasThere);
+            if (wasThere)
+                return isOfMemo && !m_sync.m_orphans.contains(copy.id) &&
+                       carryOver(copy, sources, stretch, std::nullopt);
             const auto before = gone.take(now);
-            return (before || hasOneMemo(copy)) ? carryOver(copy, sources, stretch, before) : takeAlong(copy, stretch);
+            return (before || isOfMemo) ? carryOver(copy, sources, stretch, before) : takeAlong(copy, stretch);
         });
         // What the user has written in the real programme meanwhile has no copy that he could have removed, and the memos of
         // those adrift stay.
@@ -395,12 +405,47 @@ private:
                MemoMark::keptBy(*copy.event.node()); // what was pasted from the real programme has none
     }
 
+    /// Whether the user has pasted it from a copy that is there, adrift or with an edit that its memo hasn't followed, or from a
+    /// memo that was pasted itself. Of two such copies the one that was there before is no other's.
+    bool isPasted(const PlacedMemo& copy, bool wasThere) const
+    {
+        const auto mark = markOf(copy);
+        return mark && (m_adriftMarks.contains(*mark) || (!wasThere && m_otherMarks.contains(*mark)));
+    }
+
+    /// What is pasted keeps the mark. Two copies of one memo have marks of two places.
+    static std::optional<MarkOfId> markOf(const PlacedMemo& copy)
+    {
+        const auto mark = MemoMark::keptBy(*copy.event.node());
+        return mark ? std::optional(MarkOfId{copy.id, mark->place, mark->name}) : std::nullopt;
+    }
+    void readMarks(const PlacedMemos& placed, double previewStart)
+    {
+        for (const PlacedMemo& memo : placed.all()) {
+            if (isBefore(memo.span.start, previewStart))
+                insertMark(m_otherMarks, memo);
+        }
+        for (const PlacedMemo& copy : m_preview.adrift)
+            insertMark(m_adriftMarks, copy);
+        for (const Shown& shown : m_preview.shown) {
+            for (const PlacedMemo& copy : shown.copies) {
+                if (m_sync.m_notFollowed.contains(memoOf(copy.event)))
+                    insertMark(m_otherMarks, copy);
+            }
+        }
+    }
+    static void insertMark(std::set<MarkOfId>& marks, const PlacedMemo& copy)
+    {
+        if (const auto mark = markOf(copy))
+            marks.insert(*mark);
+    }
+
     /// Whether the user has removed the memo of a copy that he had edited before, while nobody followed. It comes back only
     /// if he edits the copy again.
     bool isLeftOfRemoved(const PlacedMemo& copy) const
     {
-        return !m_counts.contains(copy.id) && MemoMark::keptBy(*copy.event.node()) &&
-               m_sync.m_notFollowed.contains(memoOf(copy.event));
+        const bool isOrphan = !m_counts.contains(copy.id) || m_sync.m_orphans.contains(copy.id);
+        return isOrphan && MemoMark::keptBy(*copy.event.node()) && m_sync.m_notFollowed.contains(memoOf(copy.event));
     }
 
     /// The memos that a stretch shows. What was there is null where that isn't known.
@@ -542,6 +587,8 @@ private:
     const Track& m_memos;
     const Preview& m_preview;
     std::set<std::int64_t> m_adrift;
+    std::set<MarkOfId> m_adriftMarks;
+    std::set<MarkOfId> m_otherMarks;              ///< of memos, and of copies with an edit that they haven't followed
     std::map<std::int64_t, Taken> m_taken;        ///< by their ids
     std::map<std::int64_t, std::size_t> m_counts; ///< of the memos in the real programme, by their ids
     IEditTransaction& m_transaction;
@@ -552,6 +599,7 @@ private:
 void MemoSync::forget()
 {
     forgetCopies({});
+    m_orphans.clear();
     m_behind.clear();
     m_wereBehind.clear();
 }
@@ -569,7 +617,10 @@ void MemoSync::forgetCopies(const Events& events)
 void MemoSync::remember(const Track& memos, const Previewed& previewed)
 {
     // What is known in part would look as if the user had written the rest.
-    const auto lastBehind = std::exchange(m_behind, {});
+    auto lastBehind = std::exchange(m_behind, {});
+    // A memo that comes to an orphan is the later edit.
+    for (const std::int64_t id : std::exchange(m_orphans, {}))
+        lastBehind.try_emplace(id, Behind{firstOf(id), firstOf(id), {}});
     forgetCopies(previewed.events);
     if (memos.isAlive())
         note(PlacedMemos(memos), memos, previewed, lastBehind);
@@ -602,7 +653,15 @@ void MemoSync::note(const PlacedMemos& placed, const Track& memos, const Preview
             ids.insert(copy.id);
         }
     }
-    for (const auto& [id, memo] : onlyOnes(placed, previewed.offset + previewed.moved, ahead)) {
+    const double end = previewed.offset + previewed.moved;
+    std::set<std::int64_t> orphans;
+    for (const auto& [id, copies] : ahead)
+        orphans.insert(id);
+    for (const PlacedMemo& memo : placed.all()) {
+        if (isBefore(memo.span.start, end))
+            orphans.erase(memo.id);
+    }
+    for (const auto& [id, memo] : onlyOnes(placed, end, ahead)) {
         Behind behind{memo, memo, ahead.at(id)};
         if (const auto last = lastBehind.find(id); last != lastBehind.end())
             behind = laterThan(last->second, std::move(behind));
@@ -611,6 +670,7 @@ void MemoSync::note(const PlacedMemos& placed, const Track& memos, const Preview
         m_behind.emplace(id, std::move(behind));
     }
     m_notFollowed = std::move(notFollowed);
+    m_orphans = std::move(orphans);
     m_remembered = std::move(found);
     m_knownIds = std::move(ids);
 }

@@ -156,6 +156,7 @@ private:
     std::map<std::shared_ptr<core::EventBase>, std::map<std::size_t, Remembered>> m_remembered;
     std::set<std::int64_t> m_knownIds;       ///< of those copies
     std::set<Memo> m_notFollowed;            ///< the other copies
+    std::set<std::int64_t> m_orphans;        ///< of those, where no memo is there
     std::map<std::int64_t, Behind> m_behind; ///< by their ids
     /// In all of the preview: what a memo had been like, by what it and its copies were like.
     std::map<std::pair<Memo, std::set<Memo>>, Memo> m_wereBehind;

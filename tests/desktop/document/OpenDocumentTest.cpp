@@ -245,6 +245,23 @@ TEST_F(OpenDocumentTest, NoticesAChangeThatLeavesSizeAndTimeAsTheyWere)
     EXPECT_EQ(contentOf(file), others);
 }
 
+TEST_F(OpenDocumentTest, ReadsAChangedFileNoSecondTimeUntilItIsSaved)
+{
+    OpenDocument& document = opened();
+    const std::string content = contentOf(file);
+    std::string others = content;
+    others.replace(others.find("DIA"), 3, "MUS");
+    writeFile(file, others);
+    fs::last_write_time(file, fs::file_time_type::clock::now() + std::chrono::hours(1));
+    EXPECT_EQ(document.fileState(), StoredFile::State::Changed);
+
+    // Only who reads it sees that it is what it was.
+    writeUnnoticeably(content);
+    EXPECT_EQ(document.fileState(), StoredFile::State::Changed);
+    EXPECT_TRUE(documents.save(document).isSaved());
+    EXPECT_EQ(document.fileState(), StoredFile::State::AsStored);
+}
+
 TEST_F(OpenDocumentTest, SavesOverAFileThatWasOnlyTouchedOrWrittenWithTheSameContent)
 {
     OpenDocument& document = opened();

@@ -150,6 +150,7 @@ protected:
     {
         struct Listener : standin::NativeWindow::Listener {
             void resizedByUser(std::int32_t, std::int32_t) override {}
+            void givenRoom(std::int32_t, std::int32_t) override {}
             void closedByUser() override {}
             void focusChanged(bool) override {}
         };

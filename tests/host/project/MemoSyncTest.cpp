@@ -1333,6 +1333,83 @@ TEST_P(MemoSyncTest, WhatIsWrittenOrPastedWhereNobodyFollowsIsWrittenInTheFilmLa
     EXPECT_EQ(film(), (Content{"cue 12", "new 13", "cue 15", "splash 19"}));
 }
 
+TEST_P(MemoSyncTest, KeepsItsNameWhenItsCopyIsTakenFromWhereNothingIsLeftOfTheSource)
+{
+    preview({tenSeconds(), event("01:00:22:00", "01:00:24:00", "01:00:52:00", "01:00:56:00")});
+    addCopy(u"cue", 54.5);
+    ASSERT_EQ(film(), Content{"cue 24"});
+    unfollowed([&] { rename(memoOf(u"cue"), u"loud"); });
+
+    move(copyOf(u"cue"), 35.0);
+
+    EXPECT_EQ(film(), Content{"loud 15"});
+}
+
+TEST_P(MemoSyncTest, KeepsItsNameWhenACopyIsPastedFromOneThatIsInNoStretch)
+{
+    for (const bool isFollowed : {true, false}) {
+        SCOPED_TRACE(isFollowed);
+        PreviewedMemos previewed(GetParam());
+        previewed.addMemo(u"cue", 12.0);
+        previewed.preview({tenSeconds()});
+        previewed.move(previewed.copyOf(u"cue"), 50.0);
+        previewed.rename(previewed.memoOf(u"cue"), u"loud");
+        const auto pasteIt = [&] { previewed.paste(previewed.copyOf(u"cue"), Day + 35.0, u"new"); };
+        if (isFollowed)
+            pasteIt();
+        else
+            previewed.unfollowed(pasteIt);
+
+        previewed.addCopy(u"splash", 39.0);
+
+        EXPECT_EQ(previewed.film(), (Content{"loud 12", "new 15", "splash 19"}));
+    }
+}
+
+TEST_P(MemoSyncTest, KeepsItsNameWhenACopyIsPastedFromOneThatWasTakenElsewhereWhereNobodyFollows)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds(), event("01:00:22:00", "01:00:24:00", "01:00:52:00", "01:00:54:00")});
+    unfollowed([&] {
+        move(copyOf(u"cue"), 53.0);
+        rename(memoOf(u"cue"), u"loud");
+    });
+
+    paste(copyOf(u"cue"), Day + 35.0, u"new");
+
+    EXPECT_EQ(film(), (Content{"loud 12", "new 15", "cue 23"}));
+}
+
+TEST_P(MemoSyncTest, KeepsTheNameUnderWhichTheUserPastesACopyThatHasNoMemoAnyMore)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    unfollowed([&] {
+        rename(copyOf(u"cue"), u"tick");
+        remove(memoOf(u"cue"));
+    });
+
+    paste(copyOf(u"tick"), 16.0, u"loud");
+    EXPECT_EQ(film(), Content{"loud 16"});
+    addCopy(u"splash", 39.0);
+    EXPECT_EQ(film(), (Content{"loud 16", "splash 19"}));
+}
+
+TEST_P(MemoSyncTest, KeepsItsNameWhenItIsPastedIntoThePreviewAfterItWasPastedFromThere)
+{
+    addMemo(u"cue", 12.0);
+    preview({tenSeconds()});
+    unfollowed([&] {
+        paste(copyOf(u"cue"), 17.0, u"loud");
+        remove(copyOf(u"cue"));
+        remove(memoOf(u"cue"));
+    });
+
+    paste(memoOf(u"loud"), Day + 35.0, u"new");
+
+    EXPECT_EQ(film(), (Content{"new 15", "loud 17"}));
+}
+
 TEST(MemoSync, IsNotQuadraticInThePreviewedEvents)
 {
     const auto secondsToFollow = [](int eventCount, bool hasMemos) {

@@ -343,6 +343,18 @@ TEST_F(CutRegion, HasNoFadesThatOverlapWhereThoseOfItsRegionDid)
     EXPECT_NEAR(curveOf(element, "FadeIn").at(1000.0), 0.125, 1e-6);
 }
 
+TEST_F(CutRegion, HasOneFadeWhereThatOfItsHeadReachesToItsEnd)
+{
+    const std::string fades = fade("FadeIn", 10000) + fade("FadeOut", 5000, "1 0");
+    const pugi::xml_node element = cut(fades, {48000, 8000, 2500, RegionEdge::New, RegionEdge::Old});
+    EXPECT_STREQ(element.attribute("fade-in-active").value(), "1");
+    EXPECT_STREQ(element.attribute("fade-out-active").value(), "0");
+    EXPECT_EQ(lengthOf(element, "FadeIn"), 8000);
+    // At sample 7,500 of the region: three quarters of the first fade, and half of the second.
+    EXPECT_NEAR(curveOf(element, "FadeIn").at(5500.0), 0.75 + 0.5, 1e-6);
+    EXPECT_NEAR(curveOf(element, "FadeIn").at(1000.0), 0.3, 1e-6);
+}
+
 TEST_F(CutRegion, LosesTheShortFadesOfACutWhereItsPiecesMeetAgain)
 {
     const pugi::xml_node cutOnce = cut("", {48000, 5000, 2500, RegionEdge::New, RegionEdge::New});

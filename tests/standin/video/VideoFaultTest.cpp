@@ -166,6 +166,27 @@ TEST(VideoFault, TheFramesAroundABrokenPartAreStillShown)
     }
 }
 
+TEST(VideoFault, TimesThatNoFilmHasAreNone)
+{
+    const TempFolder folder;
+    const std::string bytes = contentOf(madeFile(
+        folder, "live.mkv", "-f lavfi -i testsrc=s=32x32:r=25 -frames:v 6 -c:v libx264 -bf 0 -f matroska -live 1"));
+    // A group of pictures begins with its mark and length, and then its time, which is 0.
+    const std::size_t group = bytes.find("\x1f\x43\xb6\x75");
+    const std::size_t time = bytes.find(std::string("\xe7\x81\x00", 3), group);
+    ASSERT_NE(time, std::string::npos);
+    const auto startingAt = [&](const std::string& ticks) {
+        return folder.write("late.mkv", bytes.substr(0, time) + "\xe7\x88" + ticks + bytes.substr(time + 3));
+    };
+
+    EXPECT_EQ(reasonToOpen(startingAt("\x7f\xff\xff\xff\xff\xff\xff\xf0")), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(startingAt(std::string("\x10\x00\x00\x00\x00\x00\x10\x00", 8))), Reason::Broken);
+    // This is 2 to the power of 59. The group is longer than it says then, and loses its last picture.
+    VideoFile late(startingAt(std::string("\x08\x00\x00\x00\x00\x00\x00\x00", 8)), inGoodTime());
+    EXPECT_EQ(late.frameCount({25, 1}), 5U);
+    EXPECT_EQ(reasonOf([&] { late.picture(4, {25, 1}, Box, inGoodTime()); }), std::nullopt);
+}
+
 TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeIsBroken)
 {
     const TempFolder folder;

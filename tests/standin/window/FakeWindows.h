@@ -23,6 +23,7 @@ public:
         ~Window() override { m_owner.calls.push_back("window closed"); }
 
         void* parent() override { return this; }
+        bool hasFixedRoom() const override { return m_owner.isRoomFixed; }
         void setSize(std::int32_t width, std::int32_t height) override
         {
             m_owner.calls.push_back("size " + std::to_string(width) + " x " + std::to_string(height));
@@ -51,6 +52,7 @@ public:
     std::vector<std::string> calls;
     Window* last = nullptr;
     bool isOutOfWindows = false;
+    bool isRoomFixed = false;
 };
 
 /// A view that notes into the same list.

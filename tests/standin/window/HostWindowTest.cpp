@@ -150,6 +150,27 @@ TEST_F(HostWindowTest, RefusesASizeWhereTheDescriptionAllowsNone)
     EXPECT_EQ(taken(), Calls());
 }
 
+TEST_F(HostWindowTest, RefusesASizeWhereTheRoomIsTheHostsAlone)
+{
+    m_windows.isRoomFixed = true;
+    make();
+    m_window->open();
+    taken();
+
+    EXPECT_NE(m_window->resizeView(m_view, {0, 0, 700, 500}), ResultOk);
+    EXPECT_EQ(taken(), Calls());
+}
+
+TEST_F(HostWindowTest, GivesTheViewTheRoomThatThereIsThoughItIsLessThanItsLeastSize)
+{
+    make();
+    m_window->open();
+    taken();
+
+    m_windows.last->listener.givenRoom(499, 100);
+    EXPECT_EQ(taken(), Calls{"on size 499 x 100"});
+}
+
 TEST_F(HostWindowTest, HoldsTheUserToSizesThatTheViewCanHave)
 {
     make();

@@ -216,12 +216,22 @@ private:
 
 std::vector<char> XWindows::pixelsOf(standin::NativeWindow& window) const
 {
-    return Picture(m_display, windowOf(window)).bytes();
+    return pixelsOf(windowOf(window));
+}
+
+std::vector<char> XWindows::pixelsOf(unsigned long window) const
+{
+    return Picture(m_display, window).bytes();
 }
 
 void XWindows::writePicture(standin::NativeWindow& window, const std::filesystem::path& file) const
 {
-    const Picture picture(m_display, windowOf(window));
+    writePicture(windowOf(window), file);
+}
+
+void XWindows::writePicture(unsigned long window, const std::filesystem::path& file) const
+{
+    const Picture picture(m_display, window);
     const std::vector<std::uint8_t> colours = picture.colours();
     png_image header{};
     header.version = PNG_IMAGE_VERSION;

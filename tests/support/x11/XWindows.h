@@ -44,6 +44,9 @@ public:
     std::vector<char> pixelsOf(standin::NativeWindow& window) const;
     /// The same as a PNG file. Throws std::runtime_error when it can't be written.
     void writePicture(standin::NativeWindow& window, const std::filesystem::path& file) const;
+    /// The same of any window that lies in no other, by its number.
+    std::vector<char> pixelsOf(unsigned long window) const;
+    void writePicture(unsigned long window, const std::filesystem::path& file) const;
 
 private:
     class XWindow;

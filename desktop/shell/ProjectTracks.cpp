@@ -1,0 +1,53 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/shell/ProjectTracks.h"
+
+#include "standin/Application.h"
+#include "standin/edit/DependencyManager.h"
+#include "standin/edit/EditService.h"
+#include "standin/project/Project.h"
+#include "velmark/Implements.h"
+
+namespace desktop {
+
+using namespace Velmark;
+
+/// Tells the view that the project has changed.
+class ProjectTracks::Dependent : public Implements<Dependent, FObject> {
+public:
+    static constexpr const char* ClassName = "Dependent";
+
+    explicit Dependent(TracksView& view) : m_view(view) {}
+
+    int32 update(FUnknown* /*changed*/, int32 /*message*/) override
+    {
+        m_view.projectChanged();
+        return ResultOk;
+    }
+
+private:
+    TracksView& m_view;
+};
+
+ProjectTracks::ProjectTracks(standin::Application& application, standin::Project& project, Stills* stills)
+    : m_application(application), m_project(Counted<standin::Project>::share(&project)),
+      m_view(std::make_unique<TracksView>(project, application.edits(), stills)),
+      m_dependent(makeCounted<Dependent>(*m_view))
+{
+    m_application.dependencies().addDependent(static_cast<FObject*>(&project), m_dependent.get());
+}
+
+ProjectTracks::~ProjectTracks()
+{
+    m_application.dependencies().removeDependent(static_cast<FObject*>(m_project.get()), m_dependent.get());
+}
+
+void ProjectTracks::idle()
+{
+    if (!m_change.look(*m_project))
+        return;
+    m_view->setChange(m_change.map());
+    m_view->showEvent(m_change.event());
+}
+
+} // namespace desktop

@@ -1,0 +1,209 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/shell/Workspace.h"
+
+#include "desktop/document/DocumentError.h"
+#include "standin/base/FilePath.h"
+#include "standin/base/Utf16.h"
+#include "standin/project/Project.h"
+
+#include <ctime>
+
+namespace desktop {
+
+namespace fs = std::filesystem;
+
+using standin::toUtf16;
+using standin::toUtf8;
+
+namespace {
+
+const standin::UserBoxes::FileFilter StageFilter{"stage", "Project"};
+const standin::UserBoxes::FileFilter ArdourFilter{"ardour", "Session of Ardour"};
+const std::vector<standin::UserBoxes::FileFilter> VideoFilters{
+    {"mov", "QuickTime"}, {"mp4", "MPEG-4"}, {"m4v", "MPEG-4"}, {"mxf", "MXF"}, {"mkv", "Matroska"}, {"avi", "AVI"}};
+
+std::string quotedName(const fs::path& file)
+{
+    return std::string("\"").append(file.filename().string()).append("\"");
+}
+
+std::string clockTime(Autosave::Time time)
+{
+    const std::time_t seconds = Autosave::Time::clock::to_time_t(time);
+    std::tm parts{};
+    localtime_r(&seconds, &parts);
+    char text[32] = {};
+    std::strftime(text, sizeof text, "%Y-%m-%d %H:%M", &parts);
+    return text;
+}
+
+} // namespace
+
+void Workspace::tell(const std::string& message)
+{
+    ask(message, {u"OK"});
+}
+
+std::size_t Workspace::ask(const std::string& message, const std::vector<std::u16string>& buttons)
+{
+    return m_boxes.ask(toUtf16(message), buttons);
+}
+
+void Workspace::chooseAndOpen()
+{
+    const OpenDocument* const active = m_documents.active();
+    const std::u16string folder = active ? toUtf16(active->path().parent_path().string()) : u"";
+    for (const std::u16string& file :
+         m_boxes.chooseFiles({u"Open Project", {StageFilter, ArdourFilter}, folder, false}))
+        open(toUtf8(file));
+}
+
+bool Workspace::open(const fs::path& path)
+{
+    enum { Recover, OpenWithout, Cancel };
+    try {
+        const Opening opening = m_documents.look(path);
+        auto work = OpenDocuments::Work::Keep;
+        if (!opening.open && opening.openElsewhere &&
+            ask(quotedName(opening.file) + " is open in another program. What both save would be lost in part.",
+                {u"Open All the Same", u"Cancel"}) != 0)
+            return false;
+        if (!opening.open && opening.unsavedWork && !opening.openElsewhere) {
+            std::string question = "There is unsaved work on " + quotedName(opening.file) + " of " +
+                                   clockTime(opening.unsavedWork->time) +
+                                   ", from a program that has ended without saving it.";
+            if (opening.unsavedWork->isOfFormerFile)
+                question += " The file has been changed since then.";
+            const std::size_t answer = ask(question, {u"Recover It", u"Open without It", u"Cancel"});
+            if (answer == Cancel)
+                return false;
+            work = answer == Recover ? OpenDocuments::Work::Recover : OpenDocuments::Work::Keep;
+        }
+        m_documents.open(opening.file, work);
+        return true;
+    } catch (const DocumentError& error) {
+        tell(error.what());
+        return false;
+    }
+}
+
+bool Workspace::told(const SaveAnswer& answer)
+{
+    if (!answer.isSaved())
+        tell(answer.message);
+    return answer.isSaved();
+}
+
+bool Workspace::save(OpenDocument& document)
+{
+    const SaveAnswer answer = m_documents.save(document);
+    const bool isSaved = answer.state == SaveAnswer::State::Changed || answer.state == SaveAnswer::State::Missing
+                             ? settle(document, answer)
+                             : told(answer);
+    if (isSaved)
+        m_told.erase(&document);
+    return isSaved;
+}
+
+bool Workspace::settle(OpenDocument& document, const SaveAnswer& answer)
+{
+    enum { Write, SaveAs };
+    const bool isMissing = answer.state == SaveAnswer::State::Missing;
+    switch (ask(answer.message, {isMissing ? u"Save It There Again" : u"Overwrite", u"Save As...", u"Cancel"})) {
+    case Write:
+        return told(m_documents.overwrite(document));
+    case SaveAs:
+        return saveAs(document);
+    default:
+        return false;
+    }
+}
+
+bool Workspace::saveAs(OpenDocument& document)
+{
+    const auto& filter = document.project().form() ? ArdourFilter : StageFilter;
+    const auto files =
+        m_boxes.chooseFiles({u"Save Project As", {filter}, toUtf16(document.path().parent_path().string()), true});
+    if (files.empty() || !told(m_documents.saveAs(document, toUtf8(files.front()))))
+        return false;
+    m_told.erase(&document);
+    return true;
+}
+
+bool Workspace::close(OpenDocument& document)
+{
+    enum { Save, Drop };
+    if (document.settleUnsaved()) {
+        const std::size_t answer = ask(quotedName(document.path()) + " has changes that aren't saved.",
+                                       {u"Save", u"Close without Saving", u"Cancel"});
+        const bool mayClose = answer == Drop || (answer == Save && save(document));
+        if (!mayClose)
+            return false;
+    }
+    m_told.erase(&document);
+    m_documents.close(document);
+    return true;
+}
+
+bool Workspace::closeAll()
+{
+    while (m_documents.size() > 0) {
+        OpenDocument& next = m_documents.active() ? *m_documents.active() : m_documents.at(0);
+        if (!close(next))
+            return false;
+    }
+    return true;
+}
+
+bool Workspace::reload(OpenDocument& document)
+{
+    try {
+        m_told.erase(&document);
+        m_documents.reload(document);
+        return true;
+    } catch (const DocumentError& error) {
+        tell(error.what());
+        return false;
+    }
+}
+
+void Workspace::addVideos(OpenDocument& document)
+{
+    const std::u16string folder = toUtf16(document.path().parent_path().string());
+    for (const std::u16string& file : m_boxes.chooseFiles({u"Add Video", VideoFilters, folder, false}))
+        addVideo(document, toUtf8(file));
+}
+
+bool Workspace::addVideo(OpenDocument& document, const fs::path& video)
+{
+    // What lies in the project's folder can move along with it.
+    const fs::path within = video.lexically_relative(document.path().parent_path());
+    const bool isWithin = !within.empty() && *within.begin() != "..";
+    const auto path = Velmark::makeCounted<standin::FilePath>(toUtf16((isWithin ? within : video).string()));
+    if (document.project().pool().import(path.get()))
+        return true;
+    tell(quotedName(video) + " is no video that can be read.");
+    return false;
+}
+
+void Workspace::lookAtFile()
+{
+    OpenDocument* const document = m_documents.active();
+    if (!document)
+        return;
+    const StoredFile::State state = document->fileState();
+    const auto [known, isNew] = m_told.try_emplace(document, StoredFile::State::AsStored);
+    if (std::exchange(known->second, state) == state)
+        return;
+    const std::string name = quotedName(document->path());
+    if (state == StoredFile::State::Missing)
+        tell(name + " is no longer on the disk. What is open here can be saved there again.");
+    else if (state == StoredFile::State::Changed &&
+             ask(name + " was changed by another program." +
+                     (document->isUnsaved() ? " Loading it anew loses what isn't saved here." : ""),
+                 {u"Keep What Is Here", u"Load It Anew"}) == 1)
+        reload(*document);
+}
+
+} // namespace desktop

@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "desktop/document/OpenDocuments.h"
+#include "standin/services/UserBoxes.h"
+
+#include <filesystem>
+#include <map>
+#include <string>
+#include <vector>
+
+namespace desktop {
+
+/// What the user does with projects: opens, saves and closes them. It asks where something could be lost, and tells what has failed.
+/// Each act returns when the user has answered.
+class Workspace {
+public:
+    /// Both outlive it.
+    Workspace(OpenDocuments& documents, standin::UserBoxes& boxes) : m_documents(documents), m_boxes(boxes) {}
+
+    /// Asks for projects and opens them.
+    void chooseAndOpen();
+    /// False when it wasn't opened, after the user has been told why or has said so himself.
+    bool open(const std::filesystem::path& path);
+    /// False when it isn't saved, after the user has been told why or has said so himself.
+    bool save(OpenDocument& document);
+    bool saveAs(OpenDocument& document);
+    /// Asks what becomes of unsaved work. False when it stays open.
+    bool close(OpenDocument& document);
+    /// One after the other, until one stays open.
+    bool closeAll();
+    /// Asks for videos and takes them into the pool of the project.
+    void addVideos(OpenDocument& document);
+    /// Takes one in. False when it is no video, after the user has been told.
+    bool addVideo(OpenDocument& document, const std::filesystem::path& video);
+    /// Looks whether another program has changed the active project's file, and tells each change once.
+    void lookAtFile();
+
+    void tell(const std::string& message);
+
+private:
+    /// The index of the button that was used.
+    std::size_t ask(const std::string& message, const std::vector<std::u16string>& buttons);
+    bool reload(OpenDocument& document);
+    /// What the user wants when the file isn't as the document knows it.
+    bool settle(OpenDocument& document, const SaveAnswer& answer);
+    bool told(const SaveAnswer& answer);
+
+    OpenDocuments& m_documents;
+    standin::UserBoxes& m_boxes;
+    std::map<const OpenDocument*, StoredFile::State> m_told;
+};
+
+} // namespace desktop

@@ -1,0 +1,214 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/boxes/Boxes.h"
+
+#include "gui/look/LookAndFeel.h"
+#include "standin/base/Utf16.h"
+#include "tests/support/TempFolder.h"
+#include "tests/support/window/FocusedWindow.h"
+#include "tests/support/x11/VirtualScreen.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <chrono>
+#include <functional>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace desktop::tests {
+namespace {
+
+using cadrel::tests::FocusedWindow;
+using Files = std::vector<std::u16string>;
+
+/// Boxes over a window with one button. What the user does while a box waits is done one by one in its idle time.
+class BoxesTest : public testing::Test {
+protected:
+    BoxesTest()
+    {
+        m_window.addAndMakeVisible(m_desk);
+        m_desk.setBounds(m_window.getLocalBounds());
+        m_desk.addAndMakeVisible(m_button);
+        m_button.setBounds(0, 0, 40, 20);
+        m_button.onClick = [this] { ++m_clicks; };
+        m_boxes.setOpenChanged([this](bool isOpen) { m_opened.push_back(isOpen); });
+        m_loop.setIdle([this](bool isWaiting) {
+            m_waitings.push_back(isWaiting);
+            if (m_acts.empty() || m_isActing)
+                return;
+            const juce::ScopedValueSetter<bool> acting(m_isActing, true);
+            const auto act = m_acts.front();
+            m_acts.erase(m_acts.begin());
+            act();
+        });
+    }
+
+    void will(std::function<void()> act) { m_acts.push_back(std::move(act)); }
+    void willPress(int key)
+    {
+        // A box that the key opens is waited for elsewhere.
+        will([this, key] { m_window.getPeer()->handleKeyPress(juce::KeyPress(key)); });
+    }
+    void willType(const std::string& text)
+    {
+        for (const char character : text)
+            will([this, character] {
+                m_window.getPeer()->handleKeyPress(
+                    juce::KeyPress(character, {}, static_cast<juce::juce_wchar>(character)));
+            });
+    }
+    void willClickOnTheDesk()
+    {
+        will([this] { m_window.FocusedWindow::click(juce::Point<int>(20, 10)); });
+    }
+    Files save(const std::string& extension = "edl")
+    {
+        return m_boxes.chooseFiles(
+            {u"Save", {{extension, "A list"}}, standin::toUtf16((m_folder / "").string()), true});
+    }
+    Files open()
+    {
+        return m_boxes.chooseFiles({u"Open", {{"edl", "A list"}}, standin::toUtf16((m_folder / "").string()), false});
+    }
+    std::u16string pathOf(const char* name) const { return standin::toUtf16((m_folder / name).string()); }
+
+    cadrel::tests::NoScreen m_noScreen;
+    cadrel::tests::TempFolder m_folder;
+    juce::ScopedJuceInitialiser_GUI m_juce;
+    juce::SharedResourcePointer<cadrel::gui::LookAndFeel> m_look;
+    FocusedWindow m_window{1000, 800};
+    juce::Component m_desk;
+    juce::TextButton m_button{"Beneath"};
+    EventLoop m_loop;
+    Boxes m_boxes{m_loop, m_window, m_desk, "/"};
+    int m_clicks = 0;
+    std::vector<bool> m_opened;
+    std::vector<bool> m_waitings;
+    std::vector<std::function<void()>> m_acts;
+    bool m_isActing = false;
+};
+
+TEST_F(BoxesTest, AnswerTheFirstButtonOfAnAlertWithReturnAndTheLastWithEscape)
+{
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Remove", u"Cancel"}), 0U);
+    willPress(juce::KeyPress::escapeKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Remove", u"Cancel"}), 2U);
+    EXPECT_EQ(m_opened, (std::vector<bool>{true, false, true, false}));
+    EXPECT_FALSE(m_boxes.isOpen());
+}
+
+TEST_F(BoxesTest, LetNothingBeneathThemTakeInput)
+{
+    willClickOnTheDesk();
+    willPress(juce::KeyPress::escapeKey);
+    m_boxes.ask(u"Start?", {u"OK"});
+    EXPECT_EQ(m_clicks, 0);
+    m_window.click(juce::Point<int>(20, 10));
+    EXPECT_EQ(m_clicks, 1) << "Afterwards it does again.";
+}
+
+TEST_F(BoxesTest, TellTheIdleWorkWhetherItIsCalledFromWithinAnother)
+{
+    will([this] {
+        willPress(juce::KeyPress::escapeKey);
+        m_isActing = false;
+        m_boxes.ask(u"Inner", {u"OK"});
+    });
+    will([] {});
+    m_loop.runUntil([this] { return m_acts.empty(); });
+    m_loop.runUntil([this] { return !m_waitings.back(); });
+    EXPECT_FALSE(m_waitings.front());
+    EXPECT_NE(std::find(m_waitings.begin(), m_waitings.end(), true), m_waitings.end());
+    EXPECT_FALSE(m_loop.isTurning());
+}
+
+TEST_F(BoxesTest, OpenTheFileThatIsTyped)
+{
+    m_folder.write("cut.edl", "TITLE: x");
+    willType("cut.edl");
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(open(), Files{pathOf("cut.edl")});
+}
+
+TEST_F(BoxesTest, StayOpenForAFileThatIsNotThere)
+{
+    willType("cut.edl");
+    willPress(juce::KeyPress::returnKey);
+    will([this] { EXPECT_TRUE(m_boxes.isOpen()); });
+    willPress(juce::KeyPress::escapeKey);
+    EXPECT_EQ(open(), Files());
+}
+
+TEST_F(BoxesTest, AddTheExtensionToANameToBeSaved)
+{
+    willType("cut");
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(save(), Files{pathOf("cut.edl")});
+}
+
+TEST_F(BoxesTest, AskBeforeAFileIsOverwritten)
+{
+    m_folder.write("cut.edl", "TITLE: x");
+    willType("cut");
+    // This is asked over the file box, which comes back when the answer is no.
+    will([this] {
+        willPress(juce::KeyPress::escapeKey);
+        willPress(juce::KeyPress::escapeKey);
+        m_isActing = false;
+        m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::returnKey));
+    });
+    EXPECT_EQ(save(), Files());
+
+    willType("cut");
+    will([this] {
+        willPress(juce::KeyPress::returnKey);
+        m_isActing = false;
+        m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::returnKey));
+    });
+    EXPECT_EQ(save(), Files{pathOf("cut.edl")});
+    EXPECT_EQ(cadrel::tests::contentOf(m_folder / "cut.edl"), "TITLE: x") << "The box itself writes nothing.";
+}
+
+TEST_F(BoxesTest, OpenInTheFolderOfTheLastFile)
+{
+    m_folder.write("cut.edl", "TITLE: x");
+    willType("cut.edl");
+    willPress(juce::KeyPress::returnKey);
+    open();
+    willType("cut.edl");
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(m_boxes.chooseFiles({u"Open", {{"edl", "A list"}}, u"", false}), Files{pathOf("cut.edl")});
+}
+
+TEST_F(BoxesTest, ShowProgressOnlyWhenItTakesAMoment)
+{
+    EXPECT_FALSE(m_boxes.showProgress({u"Cadrel", u"Work", u"", 0, true}));
+    EXPECT_FALSE(m_boxes.isOpen());
+    std::this_thread::sleep_for(std::chrono::milliseconds(320));
+    EXPECT_FALSE(m_boxes.showProgress({u"Cadrel", u"Work", u"", 50, true}));
+    EXPECT_TRUE(m_boxes.isOpen());
+    m_boxes.endProgress();
+    EXPECT_FALSE(m_boxes.isOpen());
+    EXPECT_FALSE(m_boxes.showProgress({u"Cadrel", u"Next", u"", 0, true})) << "The next one begins anew.";
+    EXPECT_FALSE(m_boxes.isOpen());
+    m_boxes.endProgress();
+}
+
+TEST_F(BoxesTest, CancelProgressWithEscapeWhereThatIsAllowed)
+{
+    for (const bool canCancel : {true, false}) {
+        m_boxes.showProgress({u"Cadrel", u"Work", u"", 0, canCancel});
+        std::this_thread::sleep_for(std::chrono::milliseconds(320));
+        m_boxes.showProgress({u"Cadrel", u"Work", u"", 10, canCancel});
+        m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::escapeKey));
+        std::this_thread::sleep_for(std::chrono::milliseconds(40));
+        EXPECT_EQ(m_boxes.showProgress({u"Cadrel", u"Work", u"", 20, canCancel}), canCancel);
+        m_boxes.endProgress();
+    }
+}
+
+} // namespace
+} // namespace desktop::tests

@@ -1,0 +1,226 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "tests/desktop/shell/DesktopUser.h"
+
+#include "desktop/shell/ShellLayout.h"
+#include "tests/support/TreePaths.h"
+
+#include <X11/Xlib.h>
+#include <X11/Xutil.h>
+#include <X11/keysym.h>
+
+#include <chrono>
+#include <csignal>
+#include <cstdlib>
+#include <stdexcept>
+#include <thread>
+
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace desktop::tests {
+
+namespace {
+
+constexpr int Width = 1300;
+constexpr int ModuleHeight = 750;
+constexpr int TracksHeight = 300;
+constexpr int Height =
+    ShellLayout::MenuHeight + ShellLayout::TabHeight + TracksHeight + ShellLayout::DividerHeight + ModuleHeight;
+
+pid_t startProgram(const std::filesystem::path& home, const std::vector<std::string>& arguments)
+{
+    std::string program = cadrel::tests::programPath("cadrel");
+    std::vector<std::string> texts{program, "open"};
+    texts.insert(texts.end(), arguments.begin(), arguments.end());
+    const pid_t process = fork();
+    if (process != 0)
+        return process;
+    setenv("HOME", home.c_str(), 1);
+    setenv("XDG_STATE_HOME", (home / "state").c_str(), 1);
+    std::vector<char*> pointers;
+    for (std::string& text : texts)
+        pointers.push_back(text.data());
+    pointers.push_back(nullptr);
+    execv(program.c_str(), pointers.data());
+    _exit(127);
+}
+
+std::vector<Window> childrenOf(Display* display, Window window)
+{
+    Window root = 0;
+    Window parent = 0;
+    Window* children = nullptr;
+    unsigned count = 0;
+    if (XQueryTree(display, window, &root, &parent, &children, &count) == 0)
+        return {};
+    const std::vector<Window> found(children, children + count);
+    if (children)
+        XFree(children);
+    return found;
+}
+
+bool isViewable(Display* display, Window window)
+{
+    XWindowAttributes attributes;
+    return XGetWindowAttributes(display, window, &attributes) != 0 && attributes.map_state == IsViewable;
+}
+
+/// A window may go while it is looked at.
+int passOver(Display* /*display*/, XErrorEvent* /*error*/)
+{
+    return 0;
+}
+
+/// In UTF-8.
+std::string nameOf(Display* display, Window window)
+{
+    XTextProperty text = {};
+    if (XGetWMName(display, window, &text) == 0 || !text.value)
+        return {};
+    const std::string name(reinterpret_cast<const char*>(text.value), text.nitems);
+    XFree(text.value);
+    return name;
+}
+
+} // namespace
+
+DesktopUser::DesktopUser(const std::filesystem::path& home, const std::vector<std::string>& arguments,
+                         unsigned long answer)
+    : m_display(XOpenDisplay(nullptr)), m_process(startProgram(home, arguments))
+{
+    XSetErrorHandler(passOver);
+    waitFor("the window is there", [this] {
+        m_window = findWindow(DefaultRootWindow(m_display));
+        return m_window != 0;
+    });
+    m_user.setFocus(m_window);
+    constexpr int TurnsBetweenKeys = 50;
+    waitFor("Cadrel's window is in it", [&, turns = 0]() mutable {
+        const auto children = childrenOf(m_display, m_window);
+        // Not every window manager takes the first wish of a window that it has only just framed.
+        XResizeWindow(m_display, m_window, Width, Height);
+        if (children.empty() && answer != 0 && ++turns % TurnsBetweenKeys == 0)
+            press(answer);
+        XWindowAttributes attributes;
+        if (children.empty() || XGetWindowAttributes(m_display, children.front(), &attributes) == 0)
+            return false;
+        m_container = children.front();
+        return attributes.map_state == IsViewable && attributes.width == Width && attributes.height == ModuleHeight;
+    });
+}
+
+DesktopUser::~DesktopUser()
+{
+    if (!m_hasEnded) {
+        kill(m_process, SIGKILL);
+        waitpid(m_process, nullptr, 0);
+    }
+    XCloseDisplay(m_display);
+    XSetErrorHandler(nullptr);
+}
+
+unsigned long DesktopUser::findWindow(unsigned long within) const
+{
+    for (const Window window : childrenOf(m_display, within)) {
+        const std::string name = nameOf(m_display, window);
+        if (isViewable(m_display, window) && (name == "Cadrel" || name.ends_with(" - Cadrel")))
+            return window;
+        if (const Window found = findWindow(window))
+            return found;
+    }
+    return 0;
+}
+
+void DesktopUser::waitFor(const std::string& what, const std::function<bool()>& condition) const
+{
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+    while (!condition()) {
+        if (std::chrono::steady_clock::now() > end)
+            throw std::runtime_error("it doesn't come about that " + what + "; the title is " + title());
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+}
+
+void DesktopUser::click(const std::string& sheet, const std::string& name)
+{
+    const auto place = m_places.at(sheet, name);
+    int left = 0;
+    int top = 0;
+    Window child = 0;
+    XTranslateCoordinates(m_display, m_container, DefaultRootWindow(m_display), 0, 0, &left, &top, &child);
+    m_user.moveTo(left + place.x + place.width / 2, top + place.y + place.height / 2);
+    m_user.click();
+}
+
+void DesktopUser::closeWindow()
+{
+    XEvent event = {};
+    event.xclient.type = ClientMessage;
+    event.xclient.window = m_window;
+    event.xclient.message_type = XInternAtom(m_display, "WM_PROTOCOLS", False);
+    event.xclient.format = 32;
+    event.xclient.data.l[0] = static_cast<long>(XInternAtom(m_display, "WM_DELETE_WINDOW", False));
+    XSendEvent(m_display, m_window, False, NoEventMask, &event);
+    XSync(m_display, False);
+}
+
+void DesktopUser::picture(const std::string& name)
+{
+    // Longer than from a change to its being drawn.
+    constexpr int StillTurns = 40;
+    std::vector<char> shown;
+    int still = 0;
+    waitFor("the window comes to rest", [&] {
+        auto now = m_windows.pixelsOf(m_window);
+        still = now == shown ? still + 1 : 0;
+        shown = std::move(now);
+        return still > StillTurns;
+    });
+    const std::filesystem::path folder =
+        std::filesystem::path(cadrel::tests::programPath("../window")).lexically_normal();
+    std::filesystem::create_directories(folder);
+    m_windows.writePicture(m_window, folder / (name + ".png"));
+}
+
+std::string DesktopUser::title() const
+{
+    return m_window != 0 ? nameOf(m_display, m_window) : "";
+}
+
+bool DesktopUser::isBoxOpen() const
+{
+    return !isViewable(m_display, m_container);
+}
+
+void DesktopUser::waitForBox(bool isOpen)
+{
+    waitFor(isOpen ? "a box is open" : "no box is open", [&] { return isBoxOpen() == isOpen; });
+}
+
+void DesktopUser::waitForTitle(const std::string& what, const std::function<bool(const std::string&)>& fits)
+{
+    waitFor(what, [&] { return fits(title()); });
+}
+
+void DesktopUser::save()
+{
+    waitForTitle("there is unsaved work", [](const std::string& text) { return text.starts_with("*"); });
+    press('s', XK_Control_L);
+    waitForTitle("the work is saved", [](const std::string& text) { return !text.starts_with("*"); });
+}
+
+bool DesktopUser::isRunning()
+{
+    if (!m_hasEnded && waitpid(m_process, &m_status, WNOHANG) == m_process)
+        m_hasEnded = true;
+    return !m_hasEnded;
+}
+
+int DesktopUser::status()
+{
+    waitFor("the program ends", [this] { return !isRunning(); });
+    return WIFEXITED(m_status) ? WEXITSTATUS(m_status) : -1;
+}
+
+} // namespace desktop::tests

@@ -1,0 +1,74 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#pragma once
+
+#include "tests/module/WindowPlaces.h"
+#include "tests/support/x11/XUser.h"
+#include "tests/support/x11/XWindows.h"
+
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include <sys/types.h>
+
+struct _XDisplay;
+
+namespace desktop::tests {
+
+/// The desktop program in a process of its own, and a user in front of it with mouse and keyboard. The window gets a size in which
+/// Cadrel's has its smallest one, so that its controls stand where WindowPlaces says. Everything that doesn't come about within
+/// ten seconds throws std::runtime_error.
+class DesktopUser {
+public:
+    static constexpr const char* Main = "";
+    static constexpr const char* Files = "m_fileDialog";
+
+    /// Starts the program on the screen of the environment, with its state in the folder `home`, and waits for its window and
+    /// for Cadrel's. `answer` is the key that a question before that is answered with, or 0.
+    DesktopUser(const std::filesystem::path& home, const std::vector<std::string>& arguments, unsigned long answer = 0);
+    DesktopUser(const DesktopUser&) = delete;
+    DesktopUser& operator=(const DesktopUser&) = delete;
+    /// Kills the program if it still runs.
+    ~DesktopUser();
+
+    /// In the middle of a control of Cadrel's.
+    void click(const std::string& sheet, const std::string& name);
+    void press(unsigned long key, unsigned long held = 0, unsigned long heldToo = 0)
+    {
+        m_user.press(key, held, heldToo);
+    }
+    void type(const std::string& text) { m_user.type(text); }
+    /// As a window manager does it for the user.
+    void closeWindow();
+
+    /// Writes what the window shows to the folder `window` of the build, when it has come to rest. Without a window manager.
+    void picture(const std::string& name);
+
+    std::string title() const;
+    bool isBoxOpen() const;
+    void waitForBox(bool isOpen);
+    void waitForTitle(const std::string& what, const std::function<bool(const std::string&)>& fits);
+    /// Saves by the keyboard, and waits until there is no mark of unsaved work.
+    void save();
+    /// Waits for the end of the program and answers its exit status.
+    int status();
+    bool isRunning();
+
+private:
+    unsigned long findWindow(unsigned long within) const;
+    void waitFor(const std::string& what, const std::function<bool()>& condition) const;
+
+    _XDisplay* m_display;
+    pid_t m_process;
+    int m_status = 0;
+    bool m_hasEnded = false;
+    unsigned long m_window = 0;    ///< of the program
+    unsigned long m_container = 0; ///< what Cadrel's lies in
+    cadrel::tests::WindowPlaces m_places;
+    cadrel::tests::XUser m_user;
+    cadrel::tests::XWindows m_windows;
+};
+
+} // namespace desktop::tests

@@ -1,0 +1,202 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+
+#include "desktop/shell/Workspace.h"
+
+#include "standin/base/Utf16.h"
+#include "tests/desktop/document/DocumentHost.h"
+#include "tests/support/standin/FakeBoxes.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <string>
+
+namespace desktop::tests {
+namespace {
+
+namespace fs = std::filesystem;
+
+/// A user at the desk, who answers boxes as he has decided beforehand.
+class WorkspaceTest : public testing::Test, protected DocumentHost {
+protected:
+    OpenDocument& opened(const char* name = "reel.stage")
+    {
+        EXPECT_TRUE(workspace.open(writeProject(name)));
+        return *documents.active();
+    }
+    OpenDocument& edited()
+    {
+        OpenDocument& document = opened();
+        renameTrack(document, u"Edited");
+        return document;
+    }
+    /// What he was told or asked last.
+    std::string lastMessage() const { return boxes.messages.empty() ? "" : standin::toUtf8(boxes.messages.back()); }
+
+    standin::tests::FakeBoxes boxes;
+    Workspace workspace{documents, boxes};
+};
+
+TEST_F(WorkspaceTest, OpensAProjectAndAsksNothing)
+{
+    EXPECT_EQ(opened().name(), "reel.stage");
+    EXPECT_EQ(lastMessage(), "");
+}
+
+TEST_F(WorkspaceTest, TellsWhyAProjectCannotBeOpened)
+{
+    EXPECT_FALSE(workspace.open(folder / "missing.stage"));
+    EXPECT_NE(lastMessage().find("missing.stage"), std::string::npos) << lastMessage();
+    EXPECT_FALSE(workspace.open(folder.write("broken.stage", "{")));
+    EXPECT_NE(lastMessage().find("broken.stage"), std::string::npos) << lastMessage();
+    EXPECT_EQ(documents.size(), 0U);
+}
+
+TEST_F(WorkspaceTest, OpensEachOfTheProjectsThatAreChosen)
+{
+    boxes.choices = {
+        {standin::toUtf16(writeProject("a.stage").string()), standin::toUtf16(writeProject("b.stage").string())}};
+    workspace.chooseAndOpen();
+    EXPECT_EQ(documents.size(), 2U);
+    ASSERT_EQ(boxes.questions.size(), 1U);
+    EXPECT_FALSE(boxes.questions[0].isSave);
+    workspace.chooseAndOpen();
+    EXPECT_EQ(documents.size(), 2U) << "The second box was cancelled.";
+}
+
+TEST_F(WorkspaceTest, ClosesWithoutAQuestionWhatIsSaved)
+{
+    EXPECT_TRUE(workspace.close(opened()));
+    EXPECT_EQ(documents.size(), 0U);
+    EXPECT_EQ(lastMessage(), "");
+}
+
+TEST_F(WorkspaceTest, SavesBeforeItClosesWhereTheUserWantsThat)
+{
+    boxes.answers = {u"Save"};
+    EXPECT_TRUE(workspace.close(edited()));
+    EXPECT_EQ(documents.size(), 0U);
+    EXPECT_NE(contentOf(folder / "reel.stage").find("Edited"), std::string::npos);
+}
+
+TEST_F(WorkspaceTest, ClosesWithoutSavingWhereTheUserWantsThat)
+{
+    boxes.answers = {u"Close without Saving"};
+    EXPECT_TRUE(workspace.close(edited()));
+    EXPECT_EQ(documents.size(), 0U);
+    EXPECT_EQ(contentOf(folder / "reel.stage").find("Edited"), std::string::npos);
+}
+
+TEST_F(WorkspaceTest, StaysOpenWhereTheUserCancels)
+{
+    boxes.answers = {u"Cancel"};
+    EXPECT_FALSE(workspace.close(edited()));
+    EXPECT_EQ(documents.size(), 1U);
+    EXPECT_NE(lastMessage().find("reel.stage"), std::string::npos);
+}
+
+TEST_F(WorkspaceTest, StopsClosingAllAtTheFirstThatStaysOpen)
+{
+    edited();
+    opened("other.stage");
+    boxes.answers = {u"Cancel"};
+    EXPECT_FALSE(workspace.closeAll());
+    EXPECT_EQ(documents.size(), 1U) << "The one without changes was closed.";
+    boxes.answers = {u"Close without Saving"};
+    EXPECT_TRUE(workspace.closeAll());
+}
+
+TEST_F(WorkspaceTest, NeverOverwritesInSilenceWhatAnotherProgramHasWritten)
+{
+    OpenDocument& document = edited();
+    const std::string foreign = contentOf(writeProject("foreign.stage", 3));
+    for (const char16_t* const answer : {u"Cancel", u"Save As..."}) {
+        folder.write("reel.stage", foreign);
+        boxes.answers = {answer};
+        EXPECT_FALSE(workspace.save(document)) << "The box for another name is cancelled, too.";
+        EXPECT_EQ(contentOf(folder / "reel.stage"), foreign);
+    }
+    boxes.answers = {u"Overwrite"};
+    EXPECT_TRUE(workspace.save(document));
+    EXPECT_NE(contentOf(folder / "reel.stage").find("Edited"), std::string::npos);
+}
+
+TEST_F(WorkspaceTest, SavesAgainWhatIsGoneFromTheDisk)
+{
+    OpenDocument& document = edited();
+    fs::remove(folder / "reel.stage");
+    boxes.answers = {u"Save It There Again"};
+    EXPECT_TRUE(workspace.save(document));
+    EXPECT_TRUE(fs::exists(folder / "reel.stage"));
+}
+
+TEST_F(WorkspaceTest, SavesUnderAnotherNameWithTheExtensionOfItsForm)
+{
+    OpenDocument& document = edited();
+    boxes.choices = {{standin::toUtf16((folder / "new.stage").string())}};
+    EXPECT_TRUE(workspace.saveAs(document));
+    EXPECT_EQ(document.name(), "new.stage");
+    ASSERT_EQ(boxes.questions.size(), 1U);
+    EXPECT_TRUE(boxes.questions[0].isSave);
+    ASSERT_EQ(boxes.questions[0].filters.size(), 1U);
+    EXPECT_EQ(boxes.questions[0].filters[0].extension, "stage");
+}
+
+TEST_F(WorkspaceTest, TellsOnceThatTheFileWasChangedByAnotherProgram)
+{
+    opened();
+    workspace.lookAtFile();
+    EXPECT_EQ(lastMessage(), "");
+    folder.write("reel.stage", contentOf(writeProject("foreign.stage", 3)));
+    boxes.answers = {u"Keep What Is Here"};
+    workspace.lookAtFile();
+    workspace.lookAtFile();
+    EXPECT_EQ(boxes.messages.size(), 1U);
+    EXPECT_EQ(documents.active()->project().allTracks().size(), 1U);
+}
+
+TEST_F(WorkspaceTest, LoadsAChangedFileAnewWhereTheUserWantsThat)
+{
+    opened();
+    folder.write("reel.stage", contentOf(writeProject("foreign.stage", 3)));
+    boxes.answers = {u"Load It Anew"};
+    workspace.lookAtFile();
+    EXPECT_EQ(documents.size(), 1U);
+    EXPECT_EQ(documents.active()->project().allTracks().size(), 3U);
+}
+
+TEST_F(WorkspaceTest, OffersTheWorkOfAProgramThatHasEndedWithoutSaving)
+{
+    for (const bool isRecovered : {true, false}) {
+        const fs::path file = writeProject("crashed.stage");
+        Autosave::write(fs::canonical(file), ContentPrint::of(contentOf(file)),
+                        contentOf(writeProject("unsaved.stage", 2)), Autosave::Time::clock::now());
+        boxes.answers = {isRecovered ? u"Recover It" : u"Open without It"};
+        EXPECT_TRUE(workspace.open(file));
+        EXPECT_EQ(documents.active()->project().allTracks().size(), isRecovered ? 2U : 1U);
+        EXPECT_NE(lastMessage().find("crashed.stage"), std::string::npos);
+        documents.close(*documents.active());
+    }
+}
+
+TEST_F(WorkspaceTest, OpensNothingWhereTheUserCancelsTheOffer)
+{
+    const fs::path file = writeProject("crashed.stage");
+    Autosave::write(fs::canonical(file), ContentPrint::of(contentOf(file)), contentOf(writeProject("unsaved.stage", 2)),
+                    Autosave::Time::clock::now());
+    boxes.answers = {u"Cancel"};
+    EXPECT_FALSE(workspace.open(file));
+    EXPECT_EQ(documents.size(), 0U);
+    EXPECT_TRUE(fs::exists(Autosave::pathFor(fs::canonical(file)))) << "It is offered again the next time.";
+}
+
+TEST_F(WorkspaceTest, SaysThatAFileIsNoVideo)
+{
+    OpenDocument& document = opened();
+    EXPECT_FALSE(workspace.addVideo(document, folder.write("text.mov", "no film")));
+    EXPECT_NE(lastMessage().find("text.mov"), std::string::npos);
+    EXPECT_TRUE(document.project().pool().clips().empty());
+}
+
+} // namespace
+} // namespace desktop::tests
