@@ -111,6 +111,18 @@ EventList reelsOf(const std::vector<std::pair<int, int>>& startsAndLengths)
     return events;
 }
 
+/// Moves all of a reel from one frame of the day to another.
+NoteStep shiftOf(std::size_t reel, int from, int to)
+{
+    NoteStep step;
+    step.action = StepAction::MoveReel;
+    step.from = {reel, 0, from};
+    step.place = {reel, 0, to};
+    step.changes.resize(1);
+    step.changes[0].frames = to - from;
+    return step;
+}
+
 TEST(NotesPlayer, RefusesAStepThatLaysOneReelOnAnother)
 {
     const TestProject project(Framerate(25, 0));
@@ -119,12 +131,7 @@ TEST(NotesPlayer, RefusesAStepThatLaysOneReelOnAnother)
     NoteStep insert;
     insert.place = {0, 100, 90000};
     insert.inserted = {0, 1};
-    NoteStep shift;
-    shift.action = StepAction::MoveReel;
-    shift.from = {0, 0, 90000};
-    shift.place = {0, 0, 91900};
-    shift.changes.resize(1);
-    shift.changes[0].frames = 1900;
+    const NoteStep shift = shiftOf(0, 90000, 91900);
     NotesPlayer player(cut, cut, rules, {{0, 0}, {1, 1}});
 
     EXPECT_NO_THROW(player.carryOut(shift));
@@ -138,12 +145,7 @@ TEST(NotesPlayer, RefusesToMoveAReelWithoutPicture)
     const PictureRules rules{project.framerate, MatchBy::RollName, {}};
     NoteStep empty;
     empty.place = {0, 0, 90000};
-    NoteStep shift;
-    shift.action = StepAction::MoveReel;
-    shift.from = {0, 0, 90000};
-    shift.place = {0, 0, 91900};
-    shift.changes.resize(1);
-    shift.changes[0].frames = 1900;
+    const NoteStep shift = shiftOf(0, 90000, 91900);
     for (const int left : {0, 1}) {
         NotesPlayer player(reelsOf({{90000, 100}}), reelsOf({{90000, 100}}), rules, {{0, 0}});
         empty.removed = 100 - left;
@@ -219,16 +221,10 @@ std::optional<std::size_t> movesOnTheirTurns(const RandomTimeline& film, const S
     std::size_t moves = 0;
     try {
         for (std::size_t reel = 0; reel < list.reels.size(); ++reel) {
-            NoteStep shift;
-            shift.action = StepAction::MoveReel;
             const int goal = goalOf(reel, -1);
             const int start = player.timecodeAt({reel, 0, goal});
             if (goal >= 0 && start != goal) {
-                shift.from = {reel, 0, start};
-                shift.place = {reel, 0, goal};
-                shift.changes.resize(1);
-                shift.changes[0].frames = goal - start;
-                player.carryOut(shift);
+                player.carryOut(shiftOf(reel, start, goal));
                 ++moves;
             }
             for (const NoteRow& row : list.rows[reel]) {
