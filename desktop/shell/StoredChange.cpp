@@ -47,24 +47,32 @@ const standin::Bytes* storedBytes(const standin::Project& project)
 /// While it lives, all timecodes are read at the rate of one project.
 class OwnRate : public core::FramerateProvider {
 public:
-    explicit OwnRate(const core::Framerate& framerate) : m_framerate(framerate)
+    explicit OwnRate(const core::Framerate& framerate)
+        : m_former(core::Timecode::framerateProvider()), m_framerate(framerate)
     {
         core::Timecode::setFramerateProvider(this);
     }
     OwnRate(const OwnRate&) = delete;
     OwnRate& operator=(const OwnRate&) = delete;
-    ~OwnRate() { core::Timecode::setFramerateProvider(nullptr); }
+    ~OwnRate() { core::Timecode::setFramerateProvider(m_former); }
 
     core::Framerate getFramerate() const override { return m_framerate; }
 
 private:
+    const core::FramerateProvider* m_former;
     core::Framerate m_framerate;
 };
 
+/// The sound stands in the new cut where the last run of cuts has put it, or where a change EDL was carried out.
 ChangeMap::State stateOf(const core::DataModel& model)
 {
     const auto runs = core::RunRecord::find(model);
-    const bool isDone = runs && core::NextRun(model, core::ProtectedRun::sourceOf(model)).hasBeenDone(*runs);
+    if (!runs || runs->isEmpty())
+        return ChangeMap::State::Planned;
+    const auto source = core::ProtectedRun::sourceOf(model);
+    const bool isDone = source == core::ProtectedRun::Source::Given
+                            ? core::NextRun(model, source).hasBeenDone(*runs)
+                            : runs->firstDifference(model.oldEdl()) && !runs->firstDifference(model.newEdl());
     return isDone ? ChangeMap::State::Carried : ChangeMap::State::Planned;
 }
 

@@ -65,8 +65,11 @@ void ByteArchive::ensureBytes(std::size_t count) const
 
 void ByteArchive::appendBytes(std::uint64_t value, std::size_t byteCount)
 {
-    for (std::size_t index = 0; index < byteCount; ++index)
-        m_bytes.push_back(static_cast<std::uint8_t>(value >> (8 * index)));
+    // At once, as a model has millions of numbers.
+    std::array<std::uint8_t, sizeof value> bytes{};
+    for (std::size_t index = 0; index < bytes.size(); ++index)
+        bytes[index] = static_cast<std::uint8_t>(value >> (8 * index));
+    m_bytes.insert(m_bytes.end(), bytes.data(), bytes.data() + byteCount);
 }
 
 std::uint64_t ByteArchive::takeBytes(std::size_t byteCount)
