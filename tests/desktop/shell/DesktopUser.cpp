@@ -118,7 +118,7 @@ DesktopUser::DesktopUser(const std::filesystem::path& home, const std::vector<st
 DesktopUser::~DesktopUser()
 {
     if (!m_hasEnded) {
-        kill(m_process, SIGKILL);
+        killProgram();
         waitpid(m_process, nullptr, 0);
     }
     XCloseDisplay(m_display);
@@ -137,11 +137,11 @@ unsigned long DesktopUser::findWindow(unsigned long within) const
     return 0;
 }
 
-void DesktopUser::waitFor(const std::string& what, const std::function<bool()>& condition) const
+void DesktopUser::waitFor(const std::string& what, const std::function<bool()>& condition)
 {
     const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
     while (!condition()) {
-        if (std::chrono::steady_clock::now() > end)
+        if (!isRunning() || std::chrono::steady_clock::now() > end)
             throw std::runtime_error("it doesn't come about that " + what + "; the title is " + title());
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
@@ -173,8 +173,15 @@ void DesktopUser::click(const std::string& sheet, const std::string& name, const
     clickAt(m_places.at(sheet, name, text));
 }
 
+void DesktopUser::clickChangeEvent(int row)
+{
+    const WindowPlaces::Place first = m_places.at(Main, "Change Table List Box Row");
+    clickAt(first.movedBy(0, row * first.height));
+}
+
 void DesktopUser::clickSecondVideo(const char* column)
 {
+    waitForRest(10);
     const WindowPlaces::Place row = m_places.at(Videos, "VideosTable Row");
     const WindowPlaces::Place title = m_places.at(Videos, "VideosTable Column", column);
     clickAt({title.x, row.y + row.height, title.width, row.height});
@@ -289,6 +296,11 @@ bool DesktopUser::isRunning()
     if (!m_hasEnded && waitpid(m_process, &m_status, WNOHANG) == m_process)
         m_hasEnded = true;
     return !m_hasEnded;
+}
+
+void DesktopUser::killProgram() const
+{
+    kill(m_process, SIGKILL);
 }
 
 int DesktopUser::status()

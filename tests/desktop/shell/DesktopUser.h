@@ -19,7 +19,7 @@ namespace desktop::tests {
 
 /// The desktop program in a process of its own, and a user in front of it with mouse and keyboard. The window gets a size in which
 /// Cadrel's has its smallest one, so that its controls stand where WindowPlaces says. Everything that doesn't come about within
-/// ten seconds throws std::runtime_error.
+/// ten seconds, or before the program ends, throws std::runtime_error.
 class DesktopUser {
 public:
     static constexpr const char* Main = "";
@@ -36,6 +36,8 @@ public:
 
     /// In the middle of a control of Cadrel's, named as in WindowPlaces.
     void click(const std::string& sheet, const std::string& name, const std::string& text = "");
+    /// On an event of the change list, counted from 0.
+    void clickChangeEvent(int row);
     /// In the second row of the videos, below the title of a column.
     void clickSecondVideo(const char* column);
     /// Chooses an entry of a menu by the keyboard: both are counted from 0, the entries without the lines between them.
@@ -57,21 +59,23 @@ public:
     /// Waits until Cadrel's window shows both stills with these numbers in their bars.
     void waitForStills(int oldNumber, int newNumber);
 
+    /// Until what the window shows has stayed the same for so many turns of ten milliseconds or more.
+    void waitForRest(int turns);
     std::string title() const;
     bool isBoxOpen() const;
     void waitForBox(bool isOpen);
     void waitForTitle(const std::string& what, const std::function<bool(const std::string&)>& fits);
     /// Saves by the keyboard, and waits until there is no mark of unsaved work.
     void save();
+    /// At once, from any thread.
+    void killProgram() const;
     /// Waits for the end of the program and answers its exit status.
     int status();
     bool isRunning();
 
 private:
     unsigned long findWindow(unsigned long within) const;
-    void waitFor(const std::string& what, const std::function<bool()>& condition) const;
-    /// Until what the window shows has stayed the same for so many turns of ten milliseconds or more.
-    void waitForRest(int turns);
+    void waitFor(const std::string& what, const std::function<bool()>& condition);
     /// Of the screen.
     struct Pixel {
         int x;

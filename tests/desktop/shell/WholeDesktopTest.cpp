@@ -6,6 +6,7 @@
 #include "core/settings/Settings.h"
 #include "core/time/Framerate.h"
 #include "core/time/Timecode.h"
+#include "desktop/document/Autosave.h"
 #include "standin/Application.h"
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
@@ -26,9 +27,12 @@
 #include <chrono>
 #include <cmath>
 #include <csignal>
+#include <cstdlib>
 #include <filesystem>
+#include <iostream>
 #include <memory>
 #include <optional>
+#include <random>
 #include <stdexcept>
 #include <string>
 #include <thread>
@@ -143,9 +147,11 @@ protected:
         m_user->type(videoFile("v12").string());
         m_user->press(XK_Return);
         m_user->waitForBox(false);
+        m_user->save();
         m_user->click(DesktopUser::Main, "m_showNewVideosDialogButton");
         m_user->clickSecondVideo("Use as New Video");
-        m_user->press(XK_Escape);
+        // Beside the sheet, which closes it.
+        m_user->click(DesktopUser::Main, "videodisplay");
         m_user->save();
     }
     void switchPreview()
@@ -193,6 +199,77 @@ protected:
     bool isConformed() { return hasClipAt(NewStart) && !hasClipAt(OldStart); }
     bool isAsBefore() { return hasClipAt(OldStart) && !hasClipAt(NewStart); }
 
+    /// The lists of a content of the file, and how many tracks it has. Throws where it isn't whole.
+    std::vector<std::string> stateOf(const std::string& content)
+    {
+        standin::Application host;
+        standin::Project& project = host.openProject(m_file, content);
+        std::vector<std::string> state{std::to_string(project.allTracks().size())};
+        const auto stored = cadrel::tests::StoredModel::in(project);
+        if (!stored)
+            return state;
+        core::DataModel model;
+        auto archive = cadrel::tests::archiveOf(stored->block);
+        archive >> model;
+        for (const core::EventList* const list : {&model.oldEdl(), &model.newEdl(), &model.changeEdl()}) {
+            state.push_back(std::to_string(list->size()));
+            for (const std::string& timecodes : timecodesOf(*list))
+                state.push_back(timecodes);
+        }
+        return state;
+    }
+    /// Adds both cuts and generates; then undoes and redoes that, and saves every now and then.
+    void workUntilKilled()
+    {
+        // After which the program keeps unsaved work.
+        constexpr std::chrono::milliseconds Thought(600);
+        try {
+            addCut("Load Old Edl Button", "reel3_v07.edl");
+            addCut("Load New Edl Button", "reel3_v12.edl");
+            m_user->click(DesktopUser::Main, "Generate Button");
+            for (;;) {
+                for (const bool isRedone : {false, true, false}) {
+                    m_user->press('z', XK_Control_L, isRedone ? XK_Shift_L : 0);
+                    std::this_thread::sleep_for(Thought);
+                }
+                m_user->save();
+                m_user->press('z', XK_Control_L, XK_Shift_L);
+                m_user->save();
+            }
+        } catch (const std::runtime_error&) {
+        }
+    }
+    void killAt(std::chrono::milliseconds moment)
+    {
+        fs::copy_file(exampleFile("reel3.stage"), m_file, fs::copy_options::overwrite_existing);
+        start();
+        std::thread killer([&] {
+            std::this_thread::sleep_for(moment);
+            m_user->killProgram();
+        });
+        workUntilKilled();
+        killer.join();
+        EXPECT_EQ(m_user->status(), -1) << "It has ended by the signal.";
+    }
+    /// Opens the project after the program was killed; returns whether unsaved work was offered and recovered.
+    bool recover()
+    {
+        const std::string stored = cadrel::tests::contentOf(m_file);
+        EXPECT_EQ(stateOf(stored).front(), stateOf(cadrel::tests::contentOf(exampleFile("reel3.stage"))).front());
+        const auto kept = Autosave::read(m_file);
+        EXPECT_EQ(fs::exists(Autosave::pathFor(m_file)), kept.has_value());
+        const bool isOffered = kept && kept->content != stored;
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, isOffered ? XK_Return : 0);
+        if (isOffered) {
+            m_user->save();
+            EXPECT_EQ(stateOf(cadrel::tests::contentOf(m_file)), stateOf(kept->content));
+        }
+        EXPECT_FALSE(fs::exists(Autosave::pathFor(m_file)));
+        m_user->press('q', XK_Control_L);
+        EXPECT_EQ(m_user->status(), 0);
+        return isOffered;
+    }
+
     cadrel::tests::VirtualScreen m_screen{1400, 1250};
     std::optional<WindowManager> m_manager;
     cadrel::tests::TempFolder m_folder;
@@ -208,9 +285,7 @@ TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
     addCuts();
     m_user->click(DesktopUser::Main, "Generate Button");
     m_user->save();
-    m_user->click(DesktopUser::Main, "Change Table List Box Row");
-    m_user->press(XK_Down);
-    m_user->press(XK_Down);
+    m_user->clickChangeEvent(2);
     picture("desktop-generated");
     m_user->save(); // with what is selected
     const auto generated = storedModel();
@@ -314,6 +389,28 @@ TEST_P(WholeDesktopTest, OffersUnsavedWorkAfterItWasKilled)
     m_user->save();
     EXPECT_EQ(storedModel()->oldEdl().size(), 152U);
     EXPECT_FALSE(fs::exists(kept));
+}
+
+// A few times; the variable CADREL_KILLS says how often else.
+TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyMoment)
+{
+    constexpr int Longest = 5000;
+    const char* const wanted = std::getenv("CADREL_KILLS");
+    const int count = wanted ? std::atoi(wanted) : 2;
+    std::mt19937 random(GetParam() ? 2 : 1);
+    int offered = 0;
+    for (int trial = 0; trial < count; ++trial) {
+        const auto moment = std::chrono::milliseconds(random() % Longest);
+        SCOPED_TRACE(testing::Message() << "killed after " << moment.count() << " ms");
+        killAt(moment);
+        offered += recover() ? 1 : 0;
+        if (HasFailure())
+            return;
+    }
+    std::cout << "unsaved work was offered " << offered << " times of " << count << '\n';
+    if (count >= 20) {
+        EXPECT_GE(offered, count / 5);
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(WithoutAndWithAWindowManager, WholeDesktopTest, testing::Bool(),
