@@ -174,6 +174,8 @@ bool MainView::keyPressed(const juce::KeyPress& key, juce::Component* /*origin*/
     if (isBlocked && isBlocked())
         return false;
     if (key.isKeyCode(juce::KeyPress::F10Key)) {
+        // Or the keys that walk through the menus would go to the module's window.
+        m_embedded.giveKeyboardAway();
         m_menuBar.showMenu(0);
         return true;
     }
