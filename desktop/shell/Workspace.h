@@ -40,8 +40,9 @@ public:
     void tell(const std::string& message);
 
 private:
-    /// The index of the button that was used.
-    std::size_t ask(const std::string& message, const std::vector<std::u16string>& buttons);
+    /// The index of the button that was used: by Escape the last one, by Return that of index `byReturn`.
+    std::size_t ask(const std::string& message, const std::vector<std::u16string>& buttons, std::size_t byReturn = 0);
+    bool isReloadWanted(const std::string& name, bool isUnsaved);
     bool reload(OpenDocument& document);
     /// What the user wants when the file isn't as the document knows it.
     bool settle(OpenDocument& document, const SaveAnswer& answer);

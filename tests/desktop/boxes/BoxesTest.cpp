@@ -97,6 +97,8 @@ TEST_F(BoxesTest, AnswerTheFirstButtonOfAnAlertWithReturnAndTheLastWithEscape)
     willPress(juce::KeyPress::escapeKey);
     EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Remove", u"Cancel"}), 2U);
     EXPECT_EQ(m_opened, (std::vector<bool>{true, false, true, false}));
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Remove", u"Keep", u"Cancel"}, 1), 1U) << "The first one would lose something.";
     EXPECT_FALSE(m_boxes.isOpen());
 }
 
@@ -164,6 +166,16 @@ TEST_F(BoxesTest, AskBeforeAFileIsOverwritten)
 
     willType("cut");
     will([this] {
+        willPress(juce::KeyPress::returnKey);
+        willPress(juce::KeyPress::escapeKey);
+        m_isActing = false;
+        m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::returnKey));
+    });
+    EXPECT_EQ(save(), Files()) << "Return is no yes.";
+
+    willType("cut");
+    will([this] {
+        will([] { juce::Component::getCurrentlyFocusedComponent()->moveKeyboardFocusToSibling(false); });
         willPress(juce::KeyPress::returnKey);
         m_isActing = false;
         m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::returnKey));

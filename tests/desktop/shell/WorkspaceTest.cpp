@@ -16,6 +16,8 @@ namespace {
 
 namespace fs = std::filesystem;
 
+using standin::tests::FakeBoxes;
+
 /// A user at the desk, who answers boxes as he has decided beforehand.
 class WorkspaceTest : public testing::Test, protected DocumentHost {
 protected:
@@ -33,7 +35,7 @@ protected:
     /// What he was told or asked last.
     std::string lastMessage() const { return boxes.messages.empty() ? "" : standin::toUtf8(boxes.messages.back()); }
 
-    standin::tests::FakeBoxes boxes;
+    FakeBoxes boxes;
     Workspace workspace{documents, boxes};
 };
 
@@ -155,14 +157,79 @@ TEST_F(WorkspaceTest, TellsOnceThatTheFileWasChangedByAnotherProgram)
     EXPECT_EQ(documents.active()->project().allTracks().size(), 1U);
 }
 
-TEST_F(WorkspaceTest, LoadsAChangedFileAnewWhereTheUserWantsThat)
+TEST_F(WorkspaceTest, ReloadsAChangedFileWhereTheUserWantsThat)
 {
     opened();
     folder.write("reel.stage", contentOf(writeProject("foreign.stage", 3)));
-    boxes.answers = {u"Load It Anew"};
+    boxes.answers = {u"Reload"};
     workspace.lookAtFile();
     EXPECT_EQ(documents.size(), 1U);
     EXPECT_EQ(documents.active()->project().allTracks().size(), 3U);
+}
+
+// Whoever presses a key just when a box comes up.
+
+TEST_F(WorkspaceTest, KeepsUnsavedWorkOfAChangedFileWhenReturnOrEscapeIsPressed)
+{
+    for (const char16_t* const key : {FakeBoxes::Return, FakeBoxes::Escape}) {
+        OpenDocument& document = opened(key == FakeBoxes::Return ? "a.stage" : "b.stage");
+        renameTrack(document, u"Edited");
+        writeProject(document.name(), 3);
+        boxes.answers = {key};
+        workspace.lookAtFile();
+        EXPECT_TRUE(boxes.answers.empty()) << "It was asked.";
+        ASSERT_EQ(documents.active(), &document);
+        EXPECT_EQ(trackOf(document).name(), u"Edited");
+        EXPECT_TRUE(document.isUnsaved());
+    }
+}
+
+TEST_F(WorkspaceTest, OverwritesNothingOfAnotherProgramWhenReturnOrEscapeIsPressed)
+{
+    OpenDocument& document = edited();
+    const std::string foreign = contentOf(writeProject("foreign.stage", 3));
+    folder.write("reel.stage", foreign);
+    for (const char16_t* const key : {FakeBoxes::Return, FakeBoxes::Escape}) {
+        boxes.answers = {key};
+        EXPECT_FALSE(workspace.save(document));
+        EXPECT_EQ(contentOf(folder / "reel.stage"), foreign);
+    }
+    EXPECT_TRUE(document.isUnsaved());
+}
+
+TEST_F(WorkspaceTest, OpensNothingThatIsOpenElsewhereWhenReturnOrEscapeIsPressed)
+{
+    const fs::path file = fs::canonical(writeProject("reel.stage"));
+    const DocumentLock lock(file);
+    for (const char16_t* const key : {FakeBoxes::Return, FakeBoxes::Escape}) {
+        boxes.answers = {key};
+        EXPECT_FALSE(workspace.open(file));
+    }
+    EXPECT_EQ(documents.size(), 0U);
+    boxes.answers = {u"Open All the Same"};
+    EXPECT_TRUE(workspace.open(file));
+}
+
+TEST_F(WorkspaceTest, LosesNothingWhenReturnOrEscapeIsPressedBeforeClosing)
+{
+    boxes.answers = {FakeBoxes::Escape};
+    EXPECT_FALSE(workspace.close(edited()));
+    boxes.answers = {FakeBoxes::Return};
+    EXPECT_TRUE(workspace.close(*documents.active()));
+    EXPECT_NE(contentOf(folder / "reel.stage").find("Edited"), std::string::npos) << "It was saved.";
+}
+
+TEST_F(WorkspaceTest, KeepsTheWorkOfAProgramThatHasEndedWhenReturnOrEscapeIsPressed)
+{
+    const fs::path file = fs::canonical(writeProject("crashed.stage"));
+    Autosave::write(file, ContentPrint::of(contentOf(file)), contentOf(writeProject("unsaved.stage", 2)),
+                    Autosave::Time::clock::now());
+    boxes.answers = {FakeBoxes::Escape};
+    EXPECT_FALSE(workspace.open(file));
+    EXPECT_TRUE(fs::exists(Autosave::pathFor(file)));
+    boxes.answers = {FakeBoxes::Return};
+    EXPECT_TRUE(workspace.open(file));
+    EXPECT_EQ(documents.active()->project().allTracks().size(), 2U);
 }
 
 TEST_F(WorkspaceTest, OffersTheWorkOfAProgramThatHasEndedWithoutSaving)
