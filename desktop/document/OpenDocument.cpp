@@ -63,9 +63,9 @@ std::string failureOf(const fs::path& file, const ProjectFileError& error)
 
 } // namespace
 
-OpenDocument::OpenDocument(standin::Application& application, standin::Project& project, StoredFile file,
-                           DocumentLock lock, bool isRecovered)
-    : m_application(application), m_project(Velmark::Counted<standin::Project>::share(&project)),
+OpenDocument::OpenDocument(std::uint64_t id, standin::Application& application, standin::Project& project,
+                           StoredFile file, DocumentLock lock, bool isRecovered)
+    : m_id(id), m_application(application), m_project(Velmark::Counted<standin::Project>::share(&project)),
       m_file(std::move(file)), m_lock(std::move(lock)),
       m_mark(isRecovered ? UnsavedMark(project, m_file.print()) : UnsavedMark(project))
 {

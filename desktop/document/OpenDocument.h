@@ -9,6 +9,7 @@
 
 #include <chrono>
 #include <cstddef>
+#include <cstdint>
 #include <filesystem>
 #include <memory>
 #include <optional>
@@ -51,6 +52,8 @@ public:
     OpenDocument& operator=(const OpenDocument&) = delete;
     ~OpenDocument();
 
+    /// Of this tab, and of no other one for as long as the program runs.
+    std::uint64_t id() const { return m_id; }
     standin::Project& project() const { return *m_project; }
     /// The file itself, with no link in its path.
     const std::filesystem::path& path() const { return m_file.path(); }
@@ -82,8 +85,8 @@ private:
     friend class OpenDocuments;
 
     /// A project that has just been opened from `file`. The application outlives it.
-    OpenDocument(standin::Application& application, standin::Project& project, StoredFile file, DocumentLock lock,
-                 bool isRecovered);
+    OpenDocument(std::uint64_t id, standin::Application& application, standin::Project& project, StoredFile file,
+                 DocumentLock lock, bool isRecovered);
 
     /// Over the file, but only as this document knows it.
     SaveAnswer save();
@@ -99,6 +102,7 @@ private:
     void dropAutosave();
     bool isWithinTransaction() const;
 
+    std::uint64_t m_id;
     standin::Application& m_application;
     Velmark::Counted<standin::Project> m_project;
     StoredFile m_file;

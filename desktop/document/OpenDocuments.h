@@ -8,6 +8,7 @@
 
 #include <chrono>
 #include <cstddef>
+#include <cstdint>
 #include <filesystem>
 #include <memory>
 #include <optional>
@@ -72,7 +73,9 @@ public:
     void close(OpenDocument& document);
 
     std::size_t size() const { return m_documents.size(); }
-    OpenDocument& at(std::size_t index) const { return *m_documents[index]; }
+    OpenDocument& at(std::size_t index) const { return *m_documents.at(index); }
+    /// Null where it is no longer open.
+    OpenDocument* withId(std::uint64_t id) const;
     /// Null where none is open.
     OpenDocument* active() const { return m_active; }
     void activate(OpenDocument& document);
@@ -97,8 +100,8 @@ private:
     std::unique_ptr<OpenDocument> openedFrom(const std::filesystem::path& path, Work work);
     /// With the content of the file where none is given.
     standin::Project& openProject(const std::filesystem::path& file, const std::string* content);
-    std::unique_ptr<OpenDocument> newDocument(standin::Project& project, StoredFile file, DocumentLock lock,
-                                              bool isRecovered);
+    std::unique_ptr<OpenDocument> newDocument(std::uint64_t id, standin::Project& project, StoredFile file,
+                                              DocumentLock lock, bool isRecovered);
     Documents::iterator placeOf(const OpenDocument& document);
 
     standin::Application& m_application;
@@ -106,6 +109,7 @@ private:
     Clock::duration m_autosaveInterval;
     Documents m_documents;
     OpenDocument* m_active = nullptr;
+    std::uint64_t m_lastId = 0;
 };
 
 } // namespace desktop

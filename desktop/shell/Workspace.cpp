@@ -147,6 +147,18 @@ bool Workspace::close(OpenDocument& document)
     return true;
 }
 
+void Workspace::activateTab(std::uint64_t id)
+{
+    if (OpenDocument* const document = m_documents.withId(id))
+        m_documents.activate(*document);
+}
+
+void Workspace::closeTab(std::uint64_t id)
+{
+    if (OpenDocument* const document = m_documents.withId(id))
+        close(*document);
+}
+
 bool Workspace::closeAll()
 {
     while (m_documents.size() > 0) {

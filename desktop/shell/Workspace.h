@@ -5,6 +5,7 @@
 #include "desktop/document/OpenDocuments.h"
 #include "standin/services/UserBoxes.h"
 
+#include <cstdint>
 #include <filesystem>
 #include <map>
 #include <string>
@@ -28,6 +29,10 @@ public:
     bool saveAs(OpenDocument& document);
     /// Asks what becomes of unsaved work. False when it stays open.
     bool close(OpenDocument& document);
+    // What is to happen to a tab by the time that it is its turn. Nothing where the tab has gone.
+
+    void activateTab(std::uint64_t id);
+    void closeTab(std::uint64_t id);
     /// One after the other, until one stays open.
     bool closeAll();
     /// Asks for videos and takes them into the pool of the project.

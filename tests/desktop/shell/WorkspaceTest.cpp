@@ -8,7 +8,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <filesystem>
+#include <stdexcept>
 #include <string>
 
 namespace desktop::tests {
@@ -255,6 +257,32 @@ TEST_F(WorkspaceTest, OpensNothingWhereTheUserCancelsTheOffer)
     EXPECT_FALSE(workspace.open(file));
     EXPECT_EQ(documents.size(), 0U);
     EXPECT_TRUE(fs::exists(Autosave::pathFor(fs::canonical(file)))) << "It is offered again the next time.";
+}
+
+TEST_F(WorkspaceTest, ClosesNoOtherTabWhenOneIsClosedTwice)
+{
+    const std::uint64_t first = opened("a.stage").id();
+    const std::uint64_t second = opened("b.stage").id();
+    workspace.closeTab(first);
+    workspace.closeTab(first);
+    workspace.activateTab(first);
+    ASSERT_EQ(documents.size(), 1U);
+    EXPECT_EQ(documents.active()->name(), "b.stage");
+    workspace.closeTab(second);
+    workspace.closeTab(second);
+    EXPECT_EQ(documents.size(), 0U);
+}
+
+TEST_F(WorkspaceTest, GivesATabThatIsOpenedLaterAnotherIdAndAReloadedOneTheSame)
+{
+    const std::uint64_t first = opened("a.stage").id();
+    workspace.closeTab(first);
+    OpenDocument& document = opened("a.stage");
+    EXPECT_NE(document.id(), first);
+    const std::uint64_t id = document.id();
+    EXPECT_EQ(documents.reload(document).id(), id);
+    EXPECT_EQ(documents.withId(id), documents.active());
+    EXPECT_THROW(documents.at(1), std::out_of_range);
 }
 
 TEST_F(WorkspaceTest, SaysThatAFileIsNoVideo)
