@@ -5,6 +5,7 @@
 #include "desktop/document/DocumentError.h"
 #include "standin/base/FilePath.h"
 #include "standin/base/Utf16.h"
+#include "standin/file/MediaMove.h"
 #include "standin/project/Project.h"
 
 #include <ctime>
@@ -191,9 +192,8 @@ void Workspace::addVideos(OpenDocument& document)
 bool Workspace::addVideo(OpenDocument& document, const fs::path& video)
 {
     // What lies in the project's folder can move along with it.
-    const fs::path within = video.lexically_relative(document.path().parent_path());
-    const bool isWithin = !within.empty() && *within.begin() != "..";
-    const auto path = Velmark::makeCounted<standin::FilePath>(toUtf16((isWithin ? within : video).string()));
+    const fs::path stored = standin::mediaPathFrom(document.path().parent_path(), video);
+    const auto path = Velmark::makeCounted<standin::FilePath>(toUtf16(stored.string()));
     if (document.project().pool().import(path.get()))
         return true;
     tell(quotedName(video) + " can't be read as a video.");

@@ -285,6 +285,52 @@ TEST_F(WorkspaceTest, GivesATabThatIsOpenedLaterAnotherIdAndAReloadedOneTheSame)
     EXPECT_THROW(documents.at(1), std::out_of_range);
 }
 
+TEST_F(WorkspaceTest, KeepsTheMediaOfAProjectThatIsSavedInAnotherFolder)
+{
+    const auto project = [](const char* path) {
+        return std::string(R"({"format": "stage", "version": 1, "framesPerSecond": 24, "tracks": [], "pool": [)"
+                           R"({"number": 1, "kind": "audio", "name": "a", "path": ")")
+            .append(path)
+            .append(R"(", "length": 2}]})");
+    };
+    const fs::path top = fs::canonical(folder / "");
+    fs::create_directories(top / "film/Audio");
+    fs::create_directories(top / "out");
+    folder.write("film/Audio/beside.wav", "");
+    struct Case {
+        const char* path;
+        const char* target;
+        std::string stored;
+    };
+    // Without the trailing slash that canonical leaves where the folder had one.
+    const std::string film = (top / "film").string();
+    for (const Case& each :
+         {Case{"Audio/a.wav", "out/x.stage", film + "/Audio/a.wav"},
+          Case{"../lib/a.wav", "out/x.stage", (top / "lib/a.wav").string()},
+          Case{"Audio/a.wav", "x.stage", "film/Audio/a.wav"}, Case{"Audio/a.wav", "film/Audio/x.stage", "a.wav"},
+          Case{"Audio/a.wav", "film/x.stage", "Audio/a.wav"}, Case{"/fx/a.wav", "out/x.stage", "/fx/a.wav"},
+          Case{"C:\\\\fx\\\\a.wav", "out/x.stage", "C:\\fx\\a.wav"}, Case{"", "out/x.stage", ""}}) {
+        folder.write("film/reel.stage", project(each.path));
+        ASSERT_TRUE(workspace.open(folder / "film/reel.stage")) << lastMessage();
+        OpenDocument& document = *documents.active();
+        const auto pathNow = [&] { return standin::toUtf8(document.project().pool().clipWith(1)->path()); };
+        const std::string before = pathNow();
+        boxes.choices = {{standin::toUtf16((top / "missing/x.stage").string())}};
+        EXPECT_FALSE(workspace.saveAs(document));
+        EXPECT_EQ(pathNow(), before) << "Nothing was stored.";
+
+        boxes.choices = {{standin::toUtf16((top / each.target).string())}};
+        ASSERT_TRUE(workspace.saveAs(document)) << lastMessage();
+        EXPECT_EQ(pathNow(), each.stored);
+        EXPECT_FALSE(document.settleUnsaved());
+        documents.close(document);
+        ASSERT_TRUE(workspace.open(top / each.target));
+        EXPECT_EQ(standin::toUtf8(documents.active()->project().pool().clipWith(1)->path()), each.stored);
+        documents.close(*documents.active());
+        fs::remove(top / each.target);
+    }
+}
+
 TEST_F(WorkspaceTest, SaysThatAFileIsNoVideo)
 {
     OpenDocument& document = opened();
