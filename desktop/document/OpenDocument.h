@@ -11,6 +11,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -83,10 +84,16 @@ public:
 
 private:
     friend class OpenDocuments;
+    using Timer = std::function<Clock::time_point()>;
+
+    /// Of work that was opened from an autosave.
+    struct Recovery {
+        ContentPrint basis; ///< the file that the work was done on
+    };
 
     /// A project that has just been opened from `file`. The application outlives it.
     OpenDocument(std::uint64_t id, standin::Application& application, standin::Project& project, StoredFile file,
-                 DocumentLock lock, bool isRecovered);
+                 DocumentLock lock, const std::optional<Recovery>& recovery, Timer timer);
 
     /// Over the file, but only as this document knows it.
     SaveAnswer save();
@@ -108,6 +115,8 @@ private:
     StoredFile m_file;
     DocumentLock m_lock;
     UnsavedMark m_mark;
+    std::optional<ContentPrint> m_formerBasis; ///< of recovered work whose file has been changed since then
+    Timer m_timer;
     std::optional<Clock::time_point> m_lookedAt;
     Clock::duration m_lookCost{};
     std::optional<Clock::time_point> m_autosavedAt;

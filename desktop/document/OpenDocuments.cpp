@@ -51,8 +51,9 @@ std::optional<Autosave> workFor(const StoredFile& file)
 
 } // namespace
 
-OpenDocuments::OpenDocuments(standin::Application& application, RecentFiles* recent, Clock::duration autosaveInterval)
-    : m_application(application), m_recent(recent), m_autosaveInterval(autosaveInterval)
+OpenDocuments::OpenDocuments(standin::Application& application, RecentFiles* recent, Clock::duration autosaveInterval,
+                             Timer timer)
+    : m_application(application), m_recent(recent), m_autosaveInterval(autosaveInterval), m_timer(std::move(timer))
 {
 }
 
@@ -101,14 +102,15 @@ std::unique_ptr<OpenDocument> OpenDocuments::openedFrom(const fs::path& path, Wo
     const std::optional<Autosave> kept = lock.isHeld() ? Autosave::read(path) : std::nullopt;
     const bool isWork = kept && ContentPrint::of(kept->content) != file.print();
     if (isWork && work == Work::Recover)
-        return newDocument(++m_lastId, openProject(path, &kept->content), std::move(file), std::move(lock), true);
+        return newDocument(++m_lastId, openProject(path, &kept->content), std::move(file), std::move(lock),
+                           OpenDocument::Recovery{kept->filePrint});
     // First, as the work is all that there is where the file can't be opened.
     standin::Project& project = openProject(path, nullptr);
     if (isWork && work == Work::Keep)
         Autosave::keepAside(path);
     else if (kept)
         Autosave::remove(path);
-    return newDocument(++m_lastId, project, std::move(file), std::move(lock), false);
+    return newDocument(++m_lastId, project, std::move(file), std::move(lock), std::nullopt);
 }
 
 standin::Project& OpenDocuments::openProject(const fs::path& file, const std::string* content)
@@ -119,12 +121,13 @@ try {
 }
 
 std::unique_ptr<OpenDocument> OpenDocuments::newDocument(std::uint64_t id, standin::Project& project, StoredFile file,
-                                                         DocumentLock lock, bool isRecovered)
+                                                         DocumentLock lock,
+                                                         const std::optional<OpenDocument::Recovery>& recovery)
 {
     // First, as what the modules do with it then is no work of the user's.
     m_application.activateProject(&project);
     return std::unique_ptr<OpenDocument>(
-        new OpenDocument(id, m_application, project, std::move(file), std::move(lock), isRecovered));
+        new OpenDocument(id, m_application, project, std::move(file), std::move(lock), recovery, m_timer));
 }
 
 OpenDocument& OpenDocuments::reload(OpenDocument& document)
@@ -134,8 +137,8 @@ OpenDocument& OpenDocuments::reload(OpenDocument& document)
     standin::Project& project = openProject(path, nullptr);
     document.dropAutosave();
     const auto place = placeOf(document);
-    std::unique_ptr<OpenDocument> former =
-        std::exchange(*place, newDocument(document.id(), project, std::move(file), std::move(document.m_lock), false));
+    std::unique_ptr<OpenDocument> former = std::exchange(
+        *place, newDocument(document.id(), project, std::move(file), std::move(document.m_lock), std::nullopt));
     m_active = place->get();
     m_application.closeProject(former->project());
     return *m_active;

@@ -10,6 +10,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -53,9 +54,12 @@ public:
 
     static constexpr Clock::duration AutosaveInterval = std::chrono::seconds(30);
 
+    /// By which the cost of an idle call is measured.
+    using Timer = std::function<Clock::time_point()>;
+
     /// Those that are opened and saved go into the list of recent files; null for none. Both outlive this.
     explicit OpenDocuments(standin::Application& application, RecentFiles* recent = nullptr,
-                           Clock::duration autosaveInterval = AutosaveInterval);
+                           Clock::duration autosaveInterval = AutosaveInterval, Timer timer = &Clock::now);
     OpenDocuments(const OpenDocuments&) = delete;
     OpenDocuments& operator=(const OpenDocuments&) = delete;
     /// Closes all, as `close` does.
@@ -101,12 +105,13 @@ private:
     /// With the content of the file where none is given.
     standin::Project& openProject(const std::filesystem::path& file, const std::string* content);
     std::unique_ptr<OpenDocument> newDocument(std::uint64_t id, standin::Project& project, StoredFile file,
-                                              DocumentLock lock, bool isRecovered);
+                                              DocumentLock lock, const std::optional<OpenDocument::Recovery>& recovery);
     Documents::iterator placeOf(const OpenDocument& document);
 
     standin::Application& m_application;
     RecentFiles* m_recent;
     Clock::duration m_autosaveInterval;
+    Timer m_timer;
     Documents m_documents;
     OpenDocument* m_active = nullptr;
     std::uint64_t m_lastId = 0;

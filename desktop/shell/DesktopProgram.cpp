@@ -91,6 +91,7 @@ void DesktopProgram::idle(bool isWaiting)
     m_documents.idle(now);
     if (now >= m_nextLook) {
         m_workspace.lookAtFile();
+        m_workspace.lookAtAutosaves();
         m_nextLook = std::chrono::steady_clock::now() + LookInterval;
     }
     refresh();
@@ -233,7 +234,10 @@ void DesktopProgram::showKeys()
                      "P  goes to the preview and back\n"
                      "G  shows where the clips stood before\n"
                      "Ctrl with the wheel, + and -  zoom in and out\n"
-                     "Shift with the wheel, Left and Right  scroll left and right");
+                     "Shift with the wheel, Left and Right  scroll left and right\n"
+                     "Home, End  go to the beginning and the end of the programme\n"
+                     "Page Up, Page Down  scroll the tracks\n"
+                     "Alt with the wheel  makes the tracks higher and lower");
 }
 
 void DesktopProgram::showAbout()

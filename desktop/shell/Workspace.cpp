@@ -207,6 +207,18 @@ bool Workspace::isReloadWanted(const std::string& name, bool isUnsaved)
                {u"Reload", u"Keep What Is Here"}, Keep) == Reload;
 }
 
+void Workspace::lookAtAutosaves()
+{
+    for (std::size_t index = 0; index < m_documents.size(); ++index) {
+        const OpenDocument& document = m_documents.at(index);
+        const std::string& fault = document.autosaveFault();
+        if (fault.empty() || !document.isUnsaved() || !m_toldFaults.try_emplace(document.id(), fault).second)
+            continue;
+        return tell("Unsaved work on " + quotedName(document.path()) + " isn't kept for you: " + fault +
+                    ".\n\nSave it now and then.");
+    }
+}
+
 void Workspace::lookAtFile()
 {
     OpenDocument* const document = m_documents.active();

@@ -42,6 +42,9 @@ public:
     /// Looks whether another program has changed the active project's file, and tells each change once.
     void lookAtFile();
 
+    /// Tells once that unsaved work of a project has no autosave, and why.
+    void lookAtAutosaves();
+
     void tell(const std::string& message);
 
 private:
@@ -56,6 +59,7 @@ private:
     OpenDocuments& m_documents;
     standin::UserBoxes& m_boxes;
     std::map<const OpenDocument*, StoredFile::State> m_told;
+    std::map<std::uint64_t, std::string> m_toldFaults; ///< of autosaves, by the ids of the documents
 };
 
 } // namespace desktop

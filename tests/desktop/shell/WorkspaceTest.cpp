@@ -331,6 +331,21 @@ TEST_F(WorkspaceTest, KeepsTheMediaOfAProjectThatIsSavedInAnotherFolder)
     }
 }
 
+TEST_F(WorkspaceTest, TellsOnceThatUnsavedWorkHasNoAutosave)
+{
+    folder.write("reel.stage.autosave", "my notes");
+    OpenDocument& document = opened();
+    workspace.lookAtAutosaves();
+    EXPECT_EQ(lastMessage(), "") << "There is nothing to be lost yet.";
+    for (const char16_t* const name : {u"A", u"B"}) {
+        renameTrack(document, name);
+        idle();
+        workspace.lookAtAutosaves();
+        EXPECT_EQ(boxes.messages.size(), 1U);
+        EXPECT_NE(lastMessage().find("reel.stage.autosave: is in the way"), std::string::npos) << lastMessage();
+    }
+}
+
 TEST_F(WorkspaceTest, SaysThatAFileIsNoVideo)
 {
     OpenDocument& document = opened();
