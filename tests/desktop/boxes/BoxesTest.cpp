@@ -13,6 +13,7 @@
 #include <algorithm>
 #include <chrono>
 #include <functional>
+#include <stdexcept>
 #include <string>
 #include <thread>
 #include <vector>
@@ -35,6 +36,8 @@ protected:
         m_button.onClick = [this] { ++m_clicks; };
         m_boxes.setOpenChanged([this](bool isOpen) { m_opened.push_back(isOpen); });
         m_loop.setIdle([this](bool isWaiting) {
+            if (std::chrono::steady_clock::now() > m_end)
+                throw std::runtime_error("no key ends the box");
             m_waitings.push_back(isWaiting);
             if (m_acts.empty() || m_isActing)
                 return;
@@ -88,6 +91,7 @@ protected:
     std::vector<bool> m_waitings;
     std::vector<std::function<void()>> m_acts;
     bool m_isActing = false;
+    std::chrono::steady_clock::time_point m_end = std::chrono::steady_clock::now() + std::chrono::seconds(60);
 };
 
 TEST_F(BoxesTest, AnswerTheFirstButtonOfAnAlertWithReturnAndTheLastWithEscape)
