@@ -45,7 +45,7 @@ std::u16string fullPathOf(const fs::path& file)
     if (error)
         throw ProjectFileError(file.string() + ": " + error.message());
     if (!isWellFormed(path))
-        throw ProjectFileError(file.string() + ": the name is no UTF-8 text");
+        throw ProjectFileError(file.string() + ": the name is no UTF-8 text; rename the file or its folder");
     return toUtf16(path);
 }
 
