@@ -381,6 +381,10 @@ TEST_F(AutosaveTest, WithAnAbsurdHeadIsNeverOffered)
 {
     const std::string content = contentOf(file);
     const ContentPrint print = ContentPrint::of(content);
+    const auto readWith = [this](const std::string& written) {
+        writeFile(autosave, written);
+        return Autosave::read(file).has_value();
+    };
     for (const char* const head :
          {"", "null", "[]", "{}", "{\"path\":1}", R"({"path":"/a","form":"stage","fileSize":-1,"fileHash":"00"})"}) {
         writeFile(autosave, std::string("Cadrel autosave 1\n").append(head).append("\n").append(content));
@@ -388,6 +392,17 @@ TEST_F(AutosaveTest, WithAnAbsurdHeadIsNeverOffered)
     }
     writeFile(autosave, "Cadrel autosave 1\n" + std::string(100000, '[') + "\n" + content);
     EXPECT_FALSE(Autosave::read(file));
+
+    Autosave::write(file, print, content, Autosave::Time(std::chrono::seconds(1000)));
+    EXPECT_TRUE(Autosave::read(file));
+    const std::string whole = contentOf(autosave);
+    const std::string time = "\"time\":1000";
+    const std::size_t place = whole.find(time);
+    ASSERT_NE(place, std::string::npos) << whole.substr(0, 300);
+    for (const char* const absurd : {"-1", "9223372037", "9223372036854775806", "1e300"})
+        EXPECT_FALSE(readWith(std::string(whole).replace(place, time.size(), std::string("\"time\":").append(absurd))))
+            << absurd;
+    EXPECT_TRUE(readWith(std::string(whole).replace(place, time.size(), "\"time\":9223372036")));
     EXPECT_EQ(print.size, content.size());
 }
 
