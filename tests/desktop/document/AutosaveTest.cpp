@@ -177,8 +177,9 @@ TEST_F(AutosaveTest, OnAFullDiskIsToldAndLeavesTheFormerOne)
     EXPECT_EQ(contentOf(autosave), first);
     EXPECT_EQ(folder.names(), names);
 
-    renameTrack(document, u"C");
-    idle();
+    idle(seconds(29));
+    EXPECT_EQ(contentOf(autosave), first);
+    idle(seconds(1)); // the disk has room again, and the user does nothing
     EXPECT_EQ(document.autosaveFault(), "");
     EXPECT_NE(contentOf(autosave), first);
 }
@@ -327,7 +328,30 @@ TEST_F(AutosaveTest, SaysThatTheFileHasChangedSinceThen)
     OpenDocument& document = opened(Work::Recover);
     EXPECT_EQ(document.project().allTracks().size(), 1U);
     EXPECT_TRUE(document.isUnsaved());
-    EXPECT_TRUE(documents.save(document).isSaved());
+
+    const std::string foreign = contentOf(file);
+    EXPECT_EQ(documents.save(document).state, State::Changed);
+    EXPECT_EQ(contentOf(file), foreign);
+    EXPECT_EQ(documents.save(document).message,
+              file.string() + ": has been changed since the time of the recovered work");
+    EXPECT_TRUE(documents.overwrite(document).isSaved());
+    renameTrack(document, u"B");
+    EXPECT_TRUE(documents.save(document).isSaved()) << "From then on the file is its own.";
+}
+
+TEST_F(AutosaveTest, SaysThatTheFileHasChangedAfterASecondCrashAsWell)
+{
+    crash();
+    writeProject("reel3.stage", 2);
+    OpenDocument& document = opened(Work::Recover);
+    renameTrack(document, u"B");
+    idle();
+    const std::string left = contentOf(autosave);
+    documents.close(document);
+    writeFile(autosave, left);
+
+    ASSERT_TRUE(documents.look(file).unsavedWork);
+    EXPECT_TRUE(documents.look(file).unsavedWork->isOfFormerFile);
 }
 
 TEST_F(AutosaveTest, ThatIsNotWholeIsNeverOffered)
