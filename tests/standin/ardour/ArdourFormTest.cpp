@@ -616,6 +616,17 @@ TEST(ArdourForm, EndsTheSessionRangeWithTheProgramme)
     EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a6209280000");
 }
 
+TEST(ArdourForm, EndsTheSessionRangeWhereTheProjectWasSetToEndEvenIfThatIsWhereItEnded)
+{
+    const SessionProject session(SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange"),
+                                             .regions = region(51, 0, 480000)});
+    eventAt(session.track("Dia"), 0).setSpan(0.0, 8.0);
+    session.project->setProjectEnd(10.0);
+    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a2822400000");
+    session.project->setProjectEnd(9.0);
+    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a2540160000");
+}
+
 TEST(ArdourForm, RefusesAClipThatTheSessionDoesNotHave)
 {
     const SessionProject session(SessionText{.regions = region(51, 0, 96000)});
