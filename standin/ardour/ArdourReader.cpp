@@ -5,6 +5,7 @@
 #include "standin/ardour/ListText.h"
 #include "standin/ardour/OwnStorage.h"
 #include "standin/ardour/RegionFades.h"
+#include "standin/ardour/RegionPiece.h"
 #include "standin/base/Text.h"
 #include "standin/base/Times.h"
 #include "standin/base/Utf16.h"
@@ -471,9 +472,28 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
     event->setClip(clip->second);
     event->setName(textOf(name));
     setId(*event, SessionKey::Region, id);
-    event->setSourceOffset(clock.secondsOf(read.start));
-    event->setSpan(clock.secondsOf(read.position), clock.secondsOf(read.position + read.length));
+    const double first = clock.secondsOf(read.position);
+    double head = first;
+    double tail = clock.secondsOf(read.position + read.length);
+    if (static_cast<double>(read.length) > 2.0 * NearToCut) {
+        head += std::max(distanceToFrame(head), 0.0);
+        tail += std::min(distanceToFrame(tail), 0.0);
+    }
+    event->setSourceOffset(clock.secondsOf(read.start) + (head - first));
+    event->setSpan(head, tail);
     event->insertInto(track);
+}
+
+double ArdourReader::distanceToFrame(double seconds) const
+{
+    const double frames = m_project->frameRate().framesPerSecond;
+    const auto samples = static_cast<double>(m_session.clock.sampleRate());
+    if (std::abs(samples / frames - std::round(samples / frames)) < 1e-6)
+        return 0.0;
+    const double origin = m_project->timeOrigin();
+    const double distance = std::round((seconds + origin) * frames) / frames - origin - seconds;
+    // Nearer by more than rounding, so that the region is whole when it is written.
+    return std::abs(distance) * samples < NearToCut - 1e-3 ? distance : 0.0;
 }
 
 void ArdourReader::readLists(SessionId route, const pugi::xml_node& node, Track& track)

@@ -47,9 +47,12 @@ private:
     void readRoute(const pugi::xml_node& route, Project& project);
     void readVca(const pugi::xml_node& vca, Project& project);
     /// The track that was stored for a route, taken out of the project, or a new one.
-    Velmark::Counted<Track> trackOf(SessionId route, Project& project);
+    Velmark::Counted<Track> trackOf(SessionId route);
     void readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track);
     void readRegion(const pugi::xml_node& region, Track& track);
+    /// How far the frame lies from a time that is near to it, in seconds; 0 for a time that isn't, and where each frame is a
+    /// whole number of samples.
+    double distanceToFrame(double seconds) const;
     void readLists(SessionId route, const pugi::xml_node& node, Track& track);
     void readList(SessionId route, const pugi::xml_node& list, Track& track, int number);
     void dropGoneTracks(Project& project);
