@@ -345,6 +345,10 @@ void ArdourReader::readRoutes(Project& project)
         if (!m_playlists.emplace(idOf(playlist), playlist).second)
             throw FileFault("Playlists", "has two playlists with one id");
     }
+    for (Track* const track : project.allTracks()) {
+        if (track->kind() == Track::Kind::Audio)
+            m_tracks.emplace(attributeId(*track, SessionKey::Route), Counted<Track>::share(track));
+    }
     for (const pugi::xml_node& route : m_root.child("Routes").children("Route"))
         readRoute(route, project);
     for (const pugi::xml_node& vca : m_root.child("VCAManager").children("VCA"))
@@ -365,7 +369,7 @@ void ArdourReader::readRoute(const pugi::xml_node& route, Project& project)
         m_session.staying.push_back("the MIDI track " + quoted(std::string_view(name)));
         return;
     }
-    const Counted<Track> track = trackOf(id, project);
+    const Counted<Track> track = trackOf(id);
     track->setName(textOf(name));
     readLists(id, route, *track);
 
@@ -393,25 +397,23 @@ void ArdourReader::readVca(const pugi::xml_node& vca, Project& project)
     if (!number || *number == 0)
         throw FileFault("VCAManager", "has a VCA without a number");
     const SessionId key = vcaKey(*number);
-    const Counted<Track> track = trackOf(key, project);
+    const Counted<Track> track = trackOf(key);
     track->setName(textOf(vca.attribute("name").value()));
     readLists(key, vca, *track);
     if (hasPoints(*track))
         track->insertInto(project);
 }
 
-Counted<Track> ArdourReader::trackOf(SessionId route, Project& project)
+Counted<Track> ArdourReader::trackOf(SessionId route)
 {
     // What Cadrel has stored of a track comes first.
-    for (Track* const candidate : project.allTracks()) {
-        if (candidate->kind() == Track::Kind::Audio && attributeId(*candidate, SessionKey::Route) == route) {
-            auto stored = Counted<Track>::share(candidate);
-            stored->remove();
-            return stored;
-        }
+    Counted<Track>& track = m_tracks[route];
+    if (!track) {
+        track = Track::create(Track::Kind::Audio);
+        setId(*track, SessionKey::Route, route);
+    } else if (track->parent()) {
+        track->remove();
     }
-    const Counted<Track> track = Track::create(Track::Kind::Audio);
-    setId(*track, SessionKey::Route, route);
     return track;
 }
 

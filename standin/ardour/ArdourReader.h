@@ -3,6 +3,7 @@
 #pragma once
 
 #include "standin/ardour/ArdourSession.h"
+#include "standin/project/Track.h"
 #include "velmark/Counted.h"
 
 #include <pugixml.hpp>
@@ -16,7 +17,6 @@ namespace standin {
 class ChangeLog;
 class MediaClip;
 class Project;
-class Track;
 
 /// Reads the text of a session. Nothing in it is trusted.
 class ArdourReader {
@@ -72,6 +72,8 @@ private:
     std::map<SessionId, Velmark::Counted<MediaClip>> m_clips; ///< by their sources
     std::map<SessionId, pugi::xml_node> m_playlists;
     std::set<SessionId> m_playlistsRead;
+    std::map<SessionId, Velmark::Counted<Track>>
+        m_tracks;                       ///< by their routes, those that Cadrel has stored and new ones
     std::vector<SessionId> m_order;     ///< of the locations
     std::set<SessionId> m_ownLocations; ///< which stand for markers on Cadrel's tracks
 };

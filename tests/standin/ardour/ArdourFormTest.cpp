@@ -13,6 +13,7 @@
 #include <gtest/gtest.h>
 #include <pugixml.hpp>
 
+#include <ctime>
 #include <filesystem>
 #include <fstream>
 #include <set>
@@ -647,6 +648,21 @@ TEST(ArdourForm, KeepsARegionThatIsShorterThanASample)
     std::string text = SessionText{.regions = region(51, 48000, 1)};
     text.replace(text.find("length=\"a5880@"), 14, "length=\"a5000@");
     EXPECT_EQ(SessionProject(text).text(), text);
+}
+
+TEST(ArdourForm, ReadsManyRoutesInTimeThatGrowsWithThem)
+{
+    SessionText text;
+    for (int route = 0; route < 20000; ++route) {
+        const std::string id = std::to_string(100000 + 2 * route);
+        const std::string list = std::to_string(100001 + 2 * route);
+        text.routes += "<Route id=\"" + id + "\" name=\"t\" default-type=\"audio\" audio-playlist=\"" + list + "\"/>";
+        text.playlists += "<Playlist id=\"" + list + "\" name=\"t\" type=\"audio\"/>";
+    }
+    const auto start = std::clock();
+    const SessionProject session(text);
+    EXPECT_EQ(session.project->allTracks().size(), 20001U);
+    EXPECT_LT(std::clock() - start, 20 * CLOCKS_PER_SEC);
 }
 
 TEST(ArdourForm, EndsTheSessionRangeWithTheProgramme)
