@@ -35,7 +35,10 @@ run:
 
 window: $(reel3)/Video/LW_R3_v12.mov
 	@cmake/build.sh release cadrel cadrel_desktop
-	build/release/bin/cadrel open $(reel3)/reel3.stage
+	@mkdir -p build/window
+	@cp $(reel3)/reel3.stage $(reel3)/*.edl build/window
+	@ln -sfn "$(CURDIR)/$(reel3)/Video" build/window/Video
+	build/release/bin/cadrel open build/window/reel3.stage
 
 $(reel3)/Video/LW_R3_v12.mov:
 	@$(MAKE) videos

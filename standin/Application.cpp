@@ -12,6 +12,7 @@
 #include "standin/edit/EditService.h"
 #include "standin/edit/ProjectManager.h"
 #include "standin/edit/Transport.h"
+#include "standin/file/MediaMove.h"
 #include "standin/file/ProjectFile.h"
 #include "standin/project/Project.h"
 #include "standin/services/AlertService.h"
@@ -44,7 +45,7 @@ std::u16string fullPathOf(const fs::path& file)
     if (error)
         throw ProjectFileError(file.string() + ": " + error.message());
     if (!isWellFormed(path))
-        throw ProjectFileError(file.string() + ": the name is no UTF-8 text");
+        throw ProjectFileError(file.string() + ": the name is no UTF-8 text; rename the file or its folder");
     return toUtf16(path);
 }
 
@@ -143,7 +144,10 @@ std::string Application::saveProject(Project& project, const fs::path& file,
 {
     std::u16string path = fullPathOf(file);
     project.announceStoring();
+    // The forms that can't be stored elsewhere refuse that below.
+    MediaMove media(project, toUtf8(path));
     std::string text = ProjectFile::write(project, file, expected);
+    media.keep();
     if (path != project.path()) {
         project.setPath(std::move(path));
         projects().renamed(project);

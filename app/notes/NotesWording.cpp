@@ -369,6 +369,16 @@ ChangeWords NotesWording::retimeWords(const PictureChange& change) const
                 former == transition ? "" : withTransition(change.hasOldTransition, change.oldShot, "had a ")})};
 }
 
+/// Of a reel that waits at a free place, and of picture that is moved into one.
+std::string NotesWording::asideText(const PictureChange& change)
+{
+    if (!change.isOutOfTheWay)
+        return {};
+    if (change.kind == ChangeKind::Moved)
+        return "at a free place until its reel's steps";
+    return change.inNew ? "out of the way until its own steps" : "out of the way until it is gone";
+}
+
 ChangeWords NotesWording::describe(const PictureChange& change) const
 {
     const auto oldPlace = [&] { return " at " + timecode(m_document.notes.oldTimecode(change.inOld->start)); };
@@ -399,7 +409,7 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
                         withTransition(change.hasOldTransition, change.oldShot)})};
     case ChangeKind::Moved:
         return {"moved " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)),
-                "in the old cut" + oldPlace()};
+                listed({"in the old cut" + oldPlace(), asideText(change)})};
     case ChangeKind::Unchanged:
         return {"unchanged " + length, withMore(name, static_cast<std::size_t>(change.shots - 1)), {}};
     case ChangeKind::Doubled:
@@ -412,8 +422,7 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
                 toPrintable(versionName(change.newShot), MostCharactersOfAName).text,
                 {}};
     case ChangeKind::ReelMoved:
-        return {length + (change.frames < 0 ? " earlier" : " later"), "the whole reel",
-                change.isOutOfTheWay ? "out of the way until its own steps" : ""};
+        return {length + (change.frames < 0 ? " earlier" : " later"), "the whole reel", asideText(change)};
     case ChangeKind::TransitionRemoved:
         return {transitionText(change), nameOf(change.oldShot), {}};
     case ChangeKind::TransitionAdded:
@@ -425,21 +434,27 @@ ChangeWords NotesWording::describe(const PictureChange& change) const
 
 std::string NotesWording::reelTitle(std::size_t reel) const
 {
+    const core::ReelNotes& notes = m_document.notes.reels()[reel];
+    const auto bySteps = [](const char* what, std::size_t step) {
+        return step == 0 ? std::string() : what + std::to_string(step);
+    };
+    return concatenated({"Reel ", std::to_string(reel + 1), ", ", reelStart(reel), reelFate(reel),
+                         bySteps(", moved by step ", notes.movedBy),
+                         bySteps(", out of the way since step ", notes.asideSince)});
+}
+
+/// Whether it is new or gone, and where it began if that was elsewhere.
+std::string NotesWording::reelFate(std::size_t reel) const
+{
     const auto& notes = m_document.notes;
     const core::ReelChange& pair = notes.reels()[reel].pair;
-    std::string title = "Reel " + std::to_string(reel + 1) + ", ";
     if (!pair.newReel)
-        return title + timecode(notes.oldCut().reels()[*pair.oldReel].timecodeStart) + ", is gone";
-    const std::int32_t start = notes.newCut().reels()[*pair.newReel].timecodeStart;
-    title += timecode(start);
+        return ", is gone";
     if (!pair.oldReel)
-        return title + ", is new";
+        return ", is new";
     const std::int32_t oldStart = notes.oldCut().reels()[*pair.oldReel].timecodeStart;
-    if (oldStart == start)
-        return title;
-    const std::size_t movedBy = notes.reels()[reel].movedBy;
-    return concatenated({title, ", began at ", timecode(oldStart),
-                         movedBy == 0 ? std::string() : ", moved by step " + std::to_string(movedBy)});
+    const bool isElsewhere = oldStart != notes.newCut().reels()[*pair.newReel].timecodeStart;
+    return isElsewhere ? ", began at " + timecode(oldStart) : std::string();
 }
 
 std::string NotesWording::reelStart(std::size_t reel) const
@@ -564,9 +579,11 @@ std::string NotesWording::order() const
         if (m_document.notes.reels().size() > 1)
             say("What is put into a reel or taken out of it leaves the starts of the others where they are.");
         if (m_document.notes.reels().size() > 1 && movesReels())
-            say("Reels are moved as a whole in such an order that none ever lies on another, also where all of them "
-                "are on "
-                "one timeline.");
+            say(m_document.notes.isOverfull()
+                    ? "Reels are moved as a whole. Where all of them are on one timeline, one of them lies on another "
+                      "for a moment, since the day has no free place for it."
+                    : "Reels are moved as a whole in such an order that none ever lies on another, also where all of "
+                      "them are on one timeline.");
         say("In the lines below a step, \"at\" is a place in the old cut. The offset of a step is what the reel has "
             "gained so far; that of kept picture is how much later it stands now than in the old cut.");
         if (m_document.layout.showsFeet)
@@ -621,7 +638,7 @@ std::string NotesWording::bothCuts() const
 std::string NotesWording::nothingHasChanged() const
 {
     return passedOver(false) == passedOver(true) ? "Nothing has changed."
-                                                 : "Nothing has changed in what could be read; see below.";
+                                                 : "Nothing has changed in the picture that could be read; see below.";
 }
 
 /// The lines of a cut that have no picture or no place that can be read, and those that were not read.

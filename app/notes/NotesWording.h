@@ -61,7 +61,7 @@ public:
     /// Feet and frames of the row, counted inclusively: "delete 12+05 through 13+04"; empty for a row that is no step. A
     /// move between reels names them, as each has feet of its own.
     std::string inFeet(const core::NoteEntry& entry) const;
-    /// "Reel 1, 03:00:00:00".
+    /// "Reel 1, 03:00:00:00, began at 03:10:00:00, moved by step 2".
     std::string reelTitle(std::size_t reel) const;
     /// Where it begins in the new cut, or in the old one where it is gone.
     std::string reelStart(std::size_t reel) const;
@@ -106,6 +106,8 @@ private:
     std::string speedText(const core::EventBase& was, const core::EventBase& now) const;
     std::string ownSpeedText(const core::EventBase* shot) const;
     std::string formerVersion(const core::PictureChange& change) const;
+    static std::string asideText(const core::PictureChange& change);
+    std::string reelFate(std::size_t reel) const;
     std::string wholeReel(const core::NoteStep& step) const;
     std::multiset<std::string> passedOver(bool isNew) const;
     bool hasSteps() const;

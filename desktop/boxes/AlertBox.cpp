@@ -27,8 +27,9 @@ int heightOf(const juce::String& text, int width)
 
 } // namespace
 
-AlertBox::AlertBox(const juce::String& title, const juce::String& message, const juce::StringArray& buttons)
-    : Box("Alert Box", title)
+AlertBox::AlertBox(const juce::String& title, const juce::String& message, const juce::StringArray& buttons,
+                   std::size_t byReturn)
+    : Box("Alert Box", title), m_byReturn(byReturn)
 {
     m_message.setName("Alert Message");
     m_message.setMultiLine(true, true);

@@ -27,17 +27,18 @@ Boxes::~Boxes()
         hide(*m_progress);
 }
 
-std::size_t Boxes::ask(const std::u16string& message, const std::vector<std::u16string>& buttons)
+std::size_t Boxes::ask(const std::u16string& message, const std::vector<std::u16string>& buttons, std::size_t byReturn)
 {
     juce::StringArray labels;
     for (const std::u16string& label : buttons)
         labels.add(toJuce(label));
-    return ask("Cadrel", toJuce(message), labels);
+    return ask("Cadrel", toJuce(message), labels, byReturn);
 }
 
-std::size_t Boxes::ask(const juce::String& title, const juce::String& message, const juce::StringArray& buttons)
+std::size_t Boxes::ask(const juce::String& title, const juce::String& message, const juce::StringArray& buttons,
+                       std::size_t byReturn)
 {
-    AlertBox box(title, message, buttons);
+    AlertBox box(title, message, buttons, byReturn);
     run(box);
     return box.answer();
 }
@@ -45,7 +46,8 @@ std::size_t Boxes::ask(const juce::String& title, const juce::String& message, c
 std::vector<std::u16string> Boxes::chooseFiles(const FileQuestion& question)
 {
     const auto askBack = [this](const juce::String& text, const juce::String& yes) {
-        return ask("Save", text, {yes, "Cancel"}) == 0;
+        enum { Yes, Cancel };
+        return ask("Save", text, {yes, "Cancel"}, Cancel) == Yes;
     };
     FileBox box(question, m_folders.startOf(standin::toUtf8(question.folder)), askBack);
     run(box);

@@ -28,7 +28,9 @@ public:
     void setOpenChanged(OpenChanged changed) { m_openChanged = std::move(changed); }
     bool isOpen() const { return !m_open.empty(); }
 
-    std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons) override;
+    using UserBoxes::ask;
+    std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons,
+                    std::size_t byReturn) override;
     std::vector<std::u16string> chooseFiles(const FileQuestion& question) override;
     /// A box comes up only when the operation takes a moment.
     bool showProgress(const Progress& progress) override;
@@ -37,7 +39,8 @@ public:
 private:
     using Clock = std::chrono::steady_clock;
 
-    std::size_t ask(const juce::String& title, const juce::String& message, const juce::StringArray& buttons);
+    std::size_t ask(const juce::String& title, const juce::String& message, const juce::StringArray& buttons,
+                    std::size_t byReturn);
     void show(Box& box);
     void hide(Box& box);
     void run(Box& box);

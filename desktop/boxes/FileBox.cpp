@@ -182,7 +182,7 @@ void FileBox::save()
     if (target.isDirectory() || !target.getParentDirectory().isDirectory())
         return;
     if (target.existsAsFile() &&
-        !m_askBack("The file \"" + target.getFileName() + "\" is there already. Is it to be overwritten?", "Overwrite"))
+        !m_askBack("\"" + target.getFileName() + "\" exists already. Overwrite it?", "Overwrite"))
         return;
     m_files = {file};
     setDone();

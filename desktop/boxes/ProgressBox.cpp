@@ -53,7 +53,7 @@ void ProgressBox::paint(juce::Graphics& graphics)
                               juce::Justification::centredLeft, cadrel::gui::getFont(TextFont), juce::Colours::black,
                               true);
     };
-    line(m_isCancelled ? juce::String("It is being cancelled ...") : toJuce(m_progress.text));
+    line(m_isCancelled ? juce::String("Cancelling ...") : toJuce(m_progress.text));
     line(toJuce(m_progress.status));
 }
 

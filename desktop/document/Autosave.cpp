@@ -72,6 +72,15 @@ ContentPrint printOf(const standin::JsonMembers& members, std::string_view sizeK
     return {countOf(members, sizeKey), *hash};
 }
 
+Autosave::Time timeOf(const standin::JsonMembers& members, std::string_view key)
+{
+    constexpr auto Latest = std::chrono::floor<std::chrono::seconds>(Autosave::Time::max().time_since_epoch()).count();
+    const std::uint64_t seconds = countOf(members, key);
+    if (seconds > static_cast<std::uint64_t>(Latest))
+        throw standin::FileFault(std::string(key), "is no time");
+    return Autosave::Time(std::chrono::seconds(static_cast<std::int64_t>(seconds)));
+}
+
 /// Throws FileFault for what isn't whole.
 Autosave parsed(std::string file)
 {
@@ -86,7 +95,7 @@ Autosave parsed(std::string file)
     autosave.path = std::string(members.text("path"));
     autosave.form = members.text("form");
     autosave.filePrint = printOf(members, "fileSize", "fileHash");
-    autosave.time = Autosave::Time(std::chrono::seconds(static_cast<std::int64_t>(countOf(members, "time"))));
+    autosave.time = timeOf(members, "time");
     const ContentPrint whole = printOf(members, "size", "hash");
     file.erase(0, end + 1);
     if (ContentPrint::of(file) != whole)

@@ -63,15 +63,17 @@ std::string failureOf(const fs::path& file, const ProjectFileError& error)
 
 } // namespace
 
-OpenDocument::OpenDocument(standin::Application& application, standin::Project& project, StoredFile file,
-                           DocumentLock lock, bool isRecovered)
-    : m_application(application), m_project(Velmark::Counted<standin::Project>::share(&project)),
+OpenDocument::OpenDocument(std::uint64_t id, standin::Application& application, standin::Project& project,
+                           StoredFile file, DocumentLock lock, const std::optional<Recovery>& recovery, Timer timer)
+    : m_id(id), m_application(application), m_project(Velmark::Counted<standin::Project>::share(&project)),
       m_file(std::move(file)), m_lock(std::move(lock)),
-      m_mark(isRecovered ? UnsavedMark(project, m_file.print()) : UnsavedMark(project))
+      m_mark(recovery ? UnsavedMark(project, m_file.print()) : UnsavedMark(project)), m_timer(std::move(timer))
 {
     // The one from which it was opened.
-    if (isRecovered && m_lock.isHeld())
+    if (recovery && m_lock.isHeld())
         m_autosavedVersion = m_mark.version();
+    if (recovery && recovery->basis != m_file.print())
+        m_formerBasis = recovery->basis;
     if (!m_lock.isHeld() && !m_lock.holder())
         m_autosaveFault = path().parent_path().string() + ": no autosave can be written into this folder";
 }
@@ -117,6 +119,8 @@ SaveAnswer OpenDocument::save()
     const StoredFile::State state = m_file.lookInside();
     if (state != StoredFile::State::AsStored)
         return answerTo(state, path());
+    if (m_formerBasis)
+        return {State::Changed, path().string() + ": has been changed since the time of the recovered work"};
     return write(path(), m_file.stamp());
 }
 
@@ -155,6 +159,7 @@ SaveAnswer OpenDocument::write(const fs::path& path, const std::optional<FileSta
         const bool isSameFile = path == this->path();
         m_file = StoredFile(path, print);
         m_mark.wasStored(print);
+        m_formerBasis.reset();
         if (isSameFile)
             dropAutosave();
         m_autosavedVersion.reset();
@@ -173,9 +178,9 @@ void OpenDocument::idle(Clock::time_point now, Clock::duration interval)
         return;
     const Clock::duration pause = std::max<Clock::duration>(ShortestLookInterval, LookShare * m_lookCost);
     if (!m_lookedAt || now - *m_lookedAt >= pause) {
-        const auto start = Clock::now();
+        const auto start = m_timer();
         m_mark.look(now);
-        m_lookCost = Clock::now() - start;
+        m_lookCost = m_timer() - start;
         m_lookedAt = now;
         if (m_lock.holder())
             retakeLock();
@@ -200,20 +205,22 @@ void OpenDocument::retakeLock()
 void OpenDocument::autosave(Clock::time_point now)
 {
     m_autosavedAt = now;
-    const auto start = Clock::now();
+    const auto start = m_timer();
     try {
         const std::string text = m_mark.takeText();
         if (!m_mark.isSet())
             return dropAutosave();
-        m_autosavedVersion = m_mark.version();
-        Autosave::write(path(), m_file.print(), text, std::chrono::system_clock::now());
+        const std::uint64_t version = m_mark.version();
+        Autosave::write(path(), m_formerBasis.value_or(m_file.print()), text, std::chrono::system_clock::now());
+        // What couldn't be written is tried again after the interval.
+        m_autosavedVersion = version;
         m_autosaveFault.clear();
     } catch (const DocumentError& error) {
         m_autosaveFault = error.what();
     } catch (const ProjectFileError& error) {
         m_autosaveFault = path().string().append(": ").append(error.what());
     }
-    m_autosaveCost = Clock::now() - start;
+    m_autosaveCost = m_timer() - start;
 }
 
 void OpenDocument::dropAutosave()

@@ -9,7 +9,9 @@
 
 #include <chrono>
 #include <cstddef>
+#include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -51,6 +53,8 @@ public:
     OpenDocument& operator=(const OpenDocument&) = delete;
     ~OpenDocument();
 
+    /// Of this tab, and of no other one for as long as the program runs.
+    std::uint64_t id() const { return m_id; }
     standin::Project& project() const { return *m_project; }
     /// The file itself, with no link in its path.
     const std::filesystem::path& path() const { return m_file.path(); }
@@ -80,10 +84,16 @@ public:
 
 private:
     friend class OpenDocuments;
+    using Timer = std::function<Clock::time_point()>;
+
+    /// Of work that was opened from an autosave.
+    struct Recovery {
+        ContentPrint basis; ///< the file that the work was done on
+    };
 
     /// A project that has just been opened from `file`. The application outlives it.
-    OpenDocument(standin::Application& application, standin::Project& project, StoredFile file, DocumentLock lock,
-                 bool isRecovered);
+    OpenDocument(std::uint64_t id, standin::Application& application, standin::Project& project, StoredFile file,
+                 DocumentLock lock, const std::optional<Recovery>& recovery, Timer timer);
 
     /// Over the file, but only as this document knows it.
     SaveAnswer save();
@@ -99,11 +109,14 @@ private:
     void dropAutosave();
     bool isWithinTransaction() const;
 
+    std::uint64_t m_id;
     standin::Application& m_application;
     Velmark::Counted<standin::Project> m_project;
     StoredFile m_file;
     DocumentLock m_lock;
     UnsavedMark m_mark;
+    std::optional<ContentPrint> m_formerBasis; ///< of recovered work whose file has been changed since then
+    Timer m_timer;
     std::optional<Clock::time_point> m_lookedAt;
     Clock::duration m_lookCost{};
     std::optional<Clock::time_point> m_autosavedAt;

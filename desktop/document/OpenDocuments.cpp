@@ -51,8 +51,9 @@ std::optional<Autosave> workFor(const StoredFile& file)
 
 } // namespace
 
-OpenDocuments::OpenDocuments(standin::Application& application, RecentFiles* recent, Clock::duration autosaveInterval)
-    : m_application(application), m_recent(recent), m_autosaveInterval(autosaveInterval)
+OpenDocuments::OpenDocuments(standin::Application& application, RecentFiles* recent, Clock::duration autosaveInterval,
+                             Timer timer)
+    : m_application(application), m_recent(recent), m_autosaveInterval(autosaveInterval), m_timer(std::move(timer))
 {
 }
 
@@ -101,14 +102,15 @@ std::unique_ptr<OpenDocument> OpenDocuments::openedFrom(const fs::path& path, Wo
     const std::optional<Autosave> kept = lock.isHeld() ? Autosave::read(path) : std::nullopt;
     const bool isWork = kept && ContentPrint::of(kept->content) != file.print();
     if (isWork && work == Work::Recover)
-        return newDocument(openProject(path, &kept->content), std::move(file), std::move(lock), true);
+        return newDocument(++m_lastId, openProject(path, &kept->content), std::move(file), std::move(lock),
+                           OpenDocument::Recovery{kept->filePrint});
     // First, as the work is all that there is where the file can't be opened.
     standin::Project& project = openProject(path, nullptr);
     if (isWork && work == Work::Keep)
         Autosave::keepAside(path);
     else if (kept)
         Autosave::remove(path);
-    return newDocument(project, std::move(file), std::move(lock), false);
+    return newDocument(++m_lastId, project, std::move(file), std::move(lock), std::nullopt);
 }
 
 standin::Project& OpenDocuments::openProject(const fs::path& file, const std::string* content)
@@ -118,13 +120,14 @@ try {
     throw DocumentError(error.what());
 }
 
-std::unique_ptr<OpenDocument> OpenDocuments::newDocument(standin::Project& project, StoredFile file, DocumentLock lock,
-                                                         bool isRecovered)
+std::unique_ptr<OpenDocument> OpenDocuments::newDocument(std::uint64_t id, standin::Project& project, StoredFile file,
+                                                         DocumentLock lock,
+                                                         const std::optional<OpenDocument::Recovery>& recovery)
 {
     // First, as what the modules do with it then is no work of the user's.
     m_application.activateProject(&project);
     return std::unique_ptr<OpenDocument>(
-        new OpenDocument(m_application, project, std::move(file), std::move(lock), isRecovered));
+        new OpenDocument(id, m_application, project, std::move(file), std::move(lock), recovery, m_timer));
 }
 
 OpenDocument& OpenDocuments::reload(OpenDocument& document)
@@ -134,8 +137,8 @@ OpenDocument& OpenDocuments::reload(OpenDocument& document)
     standin::Project& project = openProject(path, nullptr);
     document.dropAutosave();
     const auto place = placeOf(document);
-    std::unique_ptr<OpenDocument> former =
-        std::exchange(*place, newDocument(project, std::move(file), std::move(document.m_lock), false));
+    std::unique_ptr<OpenDocument> former = std::exchange(
+        *place, newDocument(document.id(), project, std::move(file), std::move(document.m_lock), std::nullopt));
     m_active = place->get();
     m_application.closeProject(former->project());
     return *m_active;
@@ -159,6 +162,12 @@ void OpenDocuments::activate(OpenDocument& document)
 {
     m_active = &document;
     m_application.activateProject(&document.project());
+}
+
+OpenDocument* OpenDocuments::withId(std::uint64_t id) const
+{
+    const auto found = std::ranges::find_if(m_documents, [&](const auto& document) { return document->id() == id; });
+    return found == m_documents.end() ? nullptr : found->get();
 }
 
 OpenDocument* OpenDocuments::find(const fs::path& path) const

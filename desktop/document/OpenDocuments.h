@@ -8,7 +8,9 @@
 
 #include <chrono>
 #include <cstddef>
+#include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -52,9 +54,12 @@ public:
 
     static constexpr Clock::duration AutosaveInterval = std::chrono::seconds(30);
 
+    /// By which the cost of an idle call is measured.
+    using Timer = std::function<Clock::time_point()>;
+
     /// Those that are opened and saved go into the list of recent files; null for none. Both outlive this.
     explicit OpenDocuments(standin::Application& application, RecentFiles* recent = nullptr,
-                           Clock::duration autosaveInterval = AutosaveInterval);
+                           Clock::duration autosaveInterval = AutosaveInterval, Timer timer = &Clock::now);
     OpenDocuments(const OpenDocuments&) = delete;
     OpenDocuments& operator=(const OpenDocuments&) = delete;
     /// Closes all, as `close` does.
@@ -72,7 +77,9 @@ public:
     void close(OpenDocument& document);
 
     std::size_t size() const { return m_documents.size(); }
-    OpenDocument& at(std::size_t index) const { return *m_documents[index]; }
+    OpenDocument& at(std::size_t index) const { return *m_documents.at(index); }
+    /// Null where it is no longer open.
+    OpenDocument* withId(std::uint64_t id) const;
     /// Null where none is open.
     OpenDocument* active() const { return m_active; }
     void activate(OpenDocument& document);
@@ -97,15 +104,17 @@ private:
     std::unique_ptr<OpenDocument> openedFrom(const std::filesystem::path& path, Work work);
     /// With the content of the file where none is given.
     standin::Project& openProject(const std::filesystem::path& file, const std::string* content);
-    std::unique_ptr<OpenDocument> newDocument(standin::Project& project, StoredFile file, DocumentLock lock,
-                                              bool isRecovered);
+    std::unique_ptr<OpenDocument> newDocument(std::uint64_t id, standin::Project& project, StoredFile file,
+                                              DocumentLock lock, const std::optional<OpenDocument::Recovery>& recovery);
     Documents::iterator placeOf(const OpenDocument& document);
 
     standin::Application& m_application;
     RecentFiles* m_recent;
     Clock::duration m_autosaveInterval;
+    Timer m_timer;
     Documents m_documents;
     OpenDocument* m_active = nullptr;
+    std::uint64_t m_lastId = 0;
 };
 
 } // namespace desktop

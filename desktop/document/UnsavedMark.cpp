@@ -66,10 +66,16 @@ void UnsavedMark::settle()
 {
     if (m_project.log().isOpen())
         return;
+    m_canAnnounce = true;
     announce();
     advance();
     if (!m_isExact)
         compare();
+    // What a module couldn't store would be lost without a question.
+    if (!m_canAnnounce) {
+        m_isSet = true;
+        m_isExact = false;
+    }
 }
 
 std::string UnsavedMark::takeText()

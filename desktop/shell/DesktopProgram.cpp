@@ -39,8 +39,8 @@ DesktopProgram::DesktopProgram(const ModulePlaces& places)
     MainView& view = m_window.view();
     view.menuState = [this] { return menuState(); };
     view.onCommand = [this](int command) { later([=, this] { choose(command); }); };
-    view.onTabChosen = [this](std::size_t tab) { later([=, this] { m_documents.activate(m_documents.at(tab)); }); };
-    view.onTabClosed = [this](std::size_t tab) { later([=, this] { m_workspace.close(m_documents.at(tab)); }); };
+    view.onTabChosen = [this](std::uint64_t id) { later([=, this] { m_workspace.activateTab(id); }); };
+    view.onTabClosed = [this](std::uint64_t id) { later([=, this] { m_workspace.closeTab(id); }); };
     view.onFilesDropped = [this](const std::vector<fs::path>& files, juce::Point<int> place) {
         later([=, this] { takeDropped(files, place); });
     };
@@ -91,6 +91,7 @@ void DesktopProgram::idle(bool isWaiting)
     m_documents.idle(now);
     if (now >= m_nextLook) {
         m_workspace.lookAtFile();
+        m_workspace.lookAtAutosaves();
         m_nextLook = std::chrono::steady_clock::now() + LookInterval;
     }
     refresh();
@@ -200,7 +201,7 @@ void DesktopProgram::passLists(const std::vector<std::string>& files, juce::Poin
 {
     EmbeddedView& embedded = m_window.view().embedded();
     if (!embedded.drop(files, embedded.getLocalPoint(&m_window.view(), place)))
-        m_workspace.tell("Drop EDLs on the table of Cadrel's window for which they are.");
+        m_workspace.tell("Drop EDLs on the Old EDL, New EDL or Change EDL table.");
 }
 
 void DesktopProgram::open(const std::vector<fs::path>& files)
@@ -232,8 +233,11 @@ void DesktopProgram::showKeys()
                      "F  shows all of the programme\n"
                      "P  goes to the preview and back\n"
                      "G  shows where the clips stood before\n"
-                     "Ctrl with the wheel, + and -  closer and further\n"
-                     "Shift with the wheel, Left and Right  back and on");
+                     "Ctrl with the wheel, + and -  zoom in and out\n"
+                     "Shift with the wheel, Left and Right  scroll left and right\n"
+                     "Home, End  go to the beginning and the end of the programme\n"
+                     "Page Up, Page Down  scroll the tracks\n"
+                     "Alt with the wheel  makes the tracks higher and lower");
 }
 
 void DesktopProgram::showAbout()
@@ -249,7 +253,7 @@ void DesktopProgram::refresh()
     std::string title = "Cadrel";
     for (std::size_t index = 0; index < m_documents.size(); ++index) {
         const OpenDocument& document = m_documents.at(index);
-        tabs.push_back({document.name(), document.path().string(), document.isUnsaved()});
+        tabs.push_back({document.id(), document.name(), document.path().string(), document.isUnsaved()});
         if (&document != m_documents.active())
             continue;
         activeTab = index;

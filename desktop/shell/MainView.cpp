@@ -70,13 +70,13 @@ MainView::MainView()
       m_embedded("Open a project with Ctrl+O, or drop one here.")
 {
     m_menuBar.setLookAndFeel(&m_menuBarLook);
-    m_tabs.onChosen = [this](std::size_t tab) {
+    m_tabs.onChosen = [this](std::uint64_t id) {
         if (onTabChosen)
-            onTabChosen(tab);
+            onTabChosen(id);
     };
-    m_tabs.onClosed = [this](std::size_t tab) {
+    m_tabs.onClosed = [this](std::uint64_t id) {
         if (onTabClosed)
-            onTabClosed(tab);
+            onTabClosed(id);
     };
     for (juce::Component* const child :
          std::initializer_list<juce::Component*>{&m_menuBar, &m_tabs, m_divider.get(), &m_embedded})
@@ -174,6 +174,8 @@ bool MainView::keyPressed(const juce::KeyPress& key, juce::Component* /*origin*/
     if (isBlocked && isBlocked())
         return false;
     if (key.isKeyCode(juce::KeyPress::F10Key)) {
+        // Or the keys that walk through the menus would go to the module's window.
+        m_embedded.giveKeyboardAway();
         m_menuBar.showMenu(0);
         return true;
     }

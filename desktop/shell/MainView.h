@@ -11,6 +11,7 @@
 #include <juce_gui_basics/juce_gui_basics.h>
 
 #include <cstddef>
+#include <cstdint>
 #include <filesystem>
 #include <functional>
 #include <vector>
@@ -30,8 +31,8 @@ public:
     /// What the menus show, asked whenever one is opened.
     std::function<MenuState()> menuState;
     std::function<void(int command)> onCommand;
-    std::function<void(std::size_t tab)> onTabChosen;
-    std::function<void(std::size_t tab)> onTabClosed;
+    std::function<void(std::uint64_t id)> onTabChosen;
+    std::function<void(std::uint64_t id)> onTabClosed;
     /// The place is in this view.
     std::function<void(const std::vector<std::filesystem::path>& files, juce::Point<int> place)> onFilesDropped;
     /// Whether commands are refused now, because a box is open.

@@ -4,14 +4,9 @@
 
 #include "standin/base/Utf16.h"
 
-#include <algorithm>
-
 namespace desktop {
 
 namespace {
-
-/// As many as fit on a screen; the whole history can be walked with the keys.
-constexpr std::size_t MostOfHistory = 40;
 
 MenuItem line()
 {
@@ -38,20 +33,16 @@ MenuItem fileMenu(const MenuState& state)
              {MenuCommand::Quit, "Quit", "Ctrl+Q"}}};
 }
 
-/// The entries around the present state, the oldest first, after the state before all of them.
+/// All entries, the oldest first, after the state before all of them. A menu that is higher than the screen scrolls.
 MenuItem historyMenu(const MenuState& state)
 {
     MenuItem history{0, "History", "", !state.undoNames.empty()};
-    const std::size_t count = state.undoNames.size();
-    const std::size_t shown = std::min(count, MostOfHistory);
-    const std::size_t first =
-        std::min(count - shown, state.undoPosition > MostOfHistory / 2 ? state.undoPosition - MostOfHistory / 2 : 0);
     const auto add = [&](std::size_t position, const std::string& text) {
         history.items.push_back(
             {MenuCommand::FirstHistory + static_cast<int>(position), text, "", true, position == state.undoPosition});
     };
-    add(first, first == 0 ? "As it was opened" : standin::toUtf8(state.undoNames[first - 1]));
-    for (std::size_t position = first + 1; position <= first + shown; ++position)
+    add(0, "As it was opened");
+    for (std::size_t position = 1; position <= state.undoNames.size(); ++position)
         add(position, standin::toUtf8(state.undoNames[position - 1]));
     return history;
 }

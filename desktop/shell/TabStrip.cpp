@@ -95,7 +95,7 @@ void TabStrip::mouseDown(const juce::MouseEvent& event)
     const bool isOnCross = crossArea(tab).expanded(Side / 2).contains(event.getPosition());
     const auto& act = isOnCross || event.mods.isMiddleButtonDown() ? onClosed : onChosen;
     if (act)
-        act(tab);
+        act(m_tabs[tab].id);
 }
 
 void TabStrip::mouseMove(const juce::MouseEvent& event)

@@ -5,6 +5,7 @@
 #include <juce_gui_basics/juce_gui_basics.h>
 
 #include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <string>
 #include <vector>
@@ -15,7 +16,8 @@ namespace desktop {
 class TabStrip : public juce::Component, public juce::SettableTooltipClient {
 public:
     struct Tab {
-        std::string name; ///< UTF-8
+        std::uint64_t id = 0; ///< of the document
+        std::string name;     ///< UTF-8
         std::string path;
         bool isUnsaved = false;
 
@@ -26,8 +28,9 @@ public:
 
     TabStrip() : Component("Tabs") {}
 
-    std::function<void(std::size_t)> onChosen;
-    std::function<void(std::size_t)> onClosed;
+    // They are told the tab's id.
+    std::function<void(std::uint64_t)> onChosen;
+    std::function<void(std::uint64_t)> onClosed;
 
     void setTabs(std::vector<Tab> tabs, std::size_t active);
     /// Of a tab, and of its cross.

@@ -5,6 +5,7 @@
 #include "desktop/document/DocumentError.h"
 #include "standin/base/FilePath.h"
 #include "standin/base/Utf16.h"
+#include "standin/file/MediaMove.h"
 #include "standin/project/Project.h"
 
 #include <ctime>
@@ -45,9 +46,9 @@ void Workspace::tell(const std::string& message)
     ask(message, {u"OK"});
 }
 
-std::size_t Workspace::ask(const std::string& message, const std::vector<std::u16string>& buttons)
+std::size_t Workspace::ask(const std::string& message, const std::vector<std::u16string>& buttons, std::size_t byReturn)
 {
-    return m_boxes.ask(toUtf16(message), buttons);
+    return m_boxes.ask(toUtf16(message), buttons, byReturn);
 }
 
 void Workspace::chooseAndOpen()
@@ -66,13 +67,13 @@ bool Workspace::open(const fs::path& path)
         const Opening opening = m_documents.look(path);
         auto work = OpenDocuments::Work::Keep;
         if (!opening.open && opening.openElsewhere &&
-            ask(quotedName(opening.file) + " is open in another program. What both save would be lost in part.",
-                {u"Open All the Same", u"Cancel"}) != 0)
+            ask(quotedName(opening.file) + " is open in another program. If you save in both, one of them loses its "
+                                           "changes. As long as it is open there, this one has no autosave.",
+                {u"Open All the Same", u"Cancel"}, 1) != 0)
             return false;
         if (!opening.open && opening.unsavedWork && !opening.openElsewhere) {
-            std::string question = "There is unsaved work on " + quotedName(opening.file) + " of " +
-                                   clockTime(opening.unsavedWork->time) +
-                                   ", from a program that has ended without saving it.";
+            std::string question = "Cadrel ended without saving " + quotedName(opening.file) +
+                                   ". It has kept the work of " + clockTime(opening.unsavedWork->time) + ".";
             if (opening.unsavedWork->isOfFormerFile)
                 question += " The file has been changed since then.";
             const std::size_t answer = ask(question, {u"Recover It", u"Open without It", u"Cancel"});
@@ -108,9 +109,10 @@ bool Workspace::save(OpenDocument& document)
 
 bool Workspace::settle(OpenDocument& document, const SaveAnswer& answer)
 {
-    enum { Write, SaveAs };
+    enum { Write, SaveAs, Cancel };
     const bool isMissing = answer.state == SaveAnswer::State::Missing;
-    switch (ask(answer.message, {isMissing ? u"Save It There Again" : u"Overwrite", u"Save As...", u"Cancel"})) {
+    switch (ask(answer.message, {isMissing ? u"Save It There Again" : u"Overwrite", u"Save As...", u"Cancel"},
+                isMissing ? Write : Cancel)) {
     case Write:
         return told(m_documents.overwrite(document));
     case SaveAs:
@@ -146,6 +148,18 @@ bool Workspace::close(OpenDocument& document)
     return true;
 }
 
+void Workspace::activateTab(std::uint64_t id)
+{
+    if (OpenDocument* const document = m_documents.withId(id))
+        m_documents.activate(*document);
+}
+
+void Workspace::closeTab(std::uint64_t id)
+{
+    if (OpenDocument* const document = m_documents.withId(id))
+        close(*document);
+}
+
 bool Workspace::closeAll()
 {
     while (m_documents.size() > 0) {
@@ -178,13 +192,31 @@ void Workspace::addVideos(OpenDocument& document)
 bool Workspace::addVideo(OpenDocument& document, const fs::path& video)
 {
     // What lies in the project's folder can move along with it.
-    const fs::path within = video.lexically_relative(document.path().parent_path());
-    const bool isWithin = !within.empty() && *within.begin() != "..";
-    const auto path = Velmark::makeCounted<standin::FilePath>(toUtf16((isWithin ? within : video).string()));
+    const fs::path stored = standin::mediaPathFrom(document.path().parent_path(), video);
+    const auto path = Velmark::makeCounted<standin::FilePath>(toUtf16(stored.string()));
     if (document.project().pool().import(path.get()))
         return true;
-    tell(quotedName(video) + " is no video that can be read.");
+    tell(quotedName(video) + " can't be read as a video.");
     return false;
+}
+
+bool Workspace::isReloadWanted(const std::string& name, bool isUnsaved)
+{
+    enum { Reload, Keep };
+    return ask(name + " was changed by another program." + (isUnsaved ? " Reloading loses what isn't saved here." : ""),
+               {u"Reload", u"Keep What Is Here"}, Keep) == Reload;
+}
+
+void Workspace::lookAtAutosaves()
+{
+    for (std::size_t index = 0; index < m_documents.size(); ++index) {
+        const OpenDocument& document = m_documents.at(index);
+        const std::string& fault = document.autosaveFault();
+        if (fault.empty() || !document.isUnsaved() || !m_toldFaults.try_emplace(document.id(), fault).second)
+            continue;
+        return tell("Unsaved work on " + quotedName(document.path()) + " isn't kept for you: " + fault +
+                    ".\n\nSave it now and then.");
+    }
 }
 
 void Workspace::lookAtFile()
@@ -199,10 +231,7 @@ void Workspace::lookAtFile()
     const std::string name = quotedName(document->path());
     if (state == StoredFile::State::Missing)
         tell(name + " is no longer on the disk. What is open here can be saved there again.");
-    else if (state == StoredFile::State::Changed &&
-             ask(name + " was changed by another program." +
-                     (document->isUnsaved() ? " Loading it anew loses what isn't saved here." : ""),
-                 {u"Keep What Is Here", u"Load It Anew"}) == 1)
+    else if (state == StoredFile::State::Changed && isReloadWanted(name, document->isUnsaved()))
         reload(*document);
 }
 

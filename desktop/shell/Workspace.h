@@ -5,6 +5,7 @@
 #include "desktop/document/OpenDocuments.h"
 #include "standin/services/UserBoxes.h"
 
+#include <cstdint>
 #include <filesystem>
 #include <map>
 #include <string>
@@ -28,6 +29,10 @@ public:
     bool saveAs(OpenDocument& document);
     /// Asks what becomes of unsaved work. False when it stays open.
     bool close(OpenDocument& document);
+    // What is to happen to a tab by the time that it is its turn. Nothing where the tab has gone.
+
+    void activateTab(std::uint64_t id);
+    void closeTab(std::uint64_t id);
     /// One after the other, until one stays open.
     bool closeAll();
     /// Asks for videos and takes them into the pool of the project.
@@ -37,11 +42,15 @@ public:
     /// Looks whether another program has changed the active project's file, and tells each change once.
     void lookAtFile();
 
+    /// Tells once that unsaved work of a project has no autosave, and why.
+    void lookAtAutosaves();
+
     void tell(const std::string& message);
 
 private:
-    /// The index of the button that was used.
-    std::size_t ask(const std::string& message, const std::vector<std::u16string>& buttons);
+    /// The index of the button that was used: by Escape the last one, by Return that of index `byReturn`.
+    std::size_t ask(const std::string& message, const std::vector<std::u16string>& buttons, std::size_t byReturn = 0);
+    bool isReloadWanted(const std::string& name, bool isUnsaved);
     bool reload(OpenDocument& document);
     /// What the user wants when the file isn't as the document knows it.
     bool settle(OpenDocument& document, const SaveAnswer& answer);
@@ -50,6 +59,7 @@ private:
     OpenDocuments& m_documents;
     standin::UserBoxes& m_boxes;
     std::map<const OpenDocument*, StoredFile::State> m_told;
+    std::map<std::uint64_t, std::string> m_toldFaults; ///< of autosaves, by the ids of the documents
 };
 
 } // namespace desktop

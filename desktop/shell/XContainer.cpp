@@ -85,6 +85,24 @@ Window firstChildOf(Display* display, Window window)
     return first;
 }
 
+/// Of the protocol for dragging between programs: the highest that the window and we have in common; 0 when it takes nothing.
+long dragVersionOf(Display* display, Window window)
+{
+    constexpr long Ours = 5;
+    Atom type = None;
+    int format = 0;
+    unsigned long count = 0;
+    unsigned long left = 0;
+    unsigned char* data = nullptr;
+    XGetWindowProperty(display, window, atomOf(display, "XdndAware"), 0, 1, False, AnyPropertyType, &type, &format,
+                       &count, &left, &data);
+    // Numbers of 32 bits come as longs.
+    const long theirs = data && format == 32 && count == 1 ? *reinterpret_cast<const long*>(data) : 0;
+    if (data)
+        XFree(data);
+    return std::min(theirs, Ours);
+}
+
 /// A message of the protocol for dragging between programs.
 void tell(Display* display, Window window, const char* message, const std::array<long, 5>& data)
 {
@@ -221,7 +239,8 @@ void XContainer::drop(const std::vector<std::string>& files, int x, int y)
 {
     Display* const display = m_connection.display();
     const Window view = firstChildOf(display, m_window);
-    if (view == 0)
+    const long version = view != 0 ? dragVersionOf(display, view) : 0;
+    if (version == 0)
         return;
     m_dropped.clear();
     for (const std::string& file : files)
@@ -232,9 +251,8 @@ void XContainer::drop(const std::vector<std::string>& files, int x, int y)
     XTranslateCoordinates(display, m_window, DefaultRootWindow(display), x, y, &left, &top, &child);
     XSetSelectionOwner(display, atomOf(display, "XdndSelection"), m_window, CurrentTime);
     const long copy = static_cast<long>(atomOf(display, "XdndActionCopy"));
-    constexpr long Version = 5L << 24;
     tell(display, view, "XdndEnter",
-         {static_cast<long>(m_window), Version, static_cast<long>(atomOf(display, UriList)), 0, 0});
+         {static_cast<long>(m_window), version << 24, static_cast<long>(atomOf(display, UriList)), 0, 0});
     tell(display, view, "XdndPosition",
          {static_cast<long>(m_window), 0, (static_cast<long>(left) << 16) | top, CurrentTime, copy});
     tell(display, view, "XdndDrop", {static_cast<long>(m_window), 0, CurrentTime, 0, 0});

@@ -41,7 +41,7 @@ public:
     /// Where the pieces of a stretch stood that the change has moved, in the order of the new programme. Empty while nothing
     /// was carried over.
     std::vector<Span> formerPlaces(const Span& stretch) const;
-    /// The new picture, black aside, that no event brings sound for, in order. Empty while nothing was carried over.
+    /// The new picture, black aside, that no event brings sound for, in order and without overlaps. Empty while nothing was carried over.
     const std::vector<Span>& withoutSound() const { return m_withoutSound; }
     /// Where the shots of the old (Planned) or of the new cut begin, in order.
     const std::vector<double>& cuts(State programme) const

@@ -17,6 +17,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <limits>
 
 namespace desktop {
 
@@ -157,10 +158,12 @@ void TrackLanes::paintRow(juce::Graphics& graphics, std::size_t row, juce::Recta
 
 void TrackLanes::paintWithoutSound(juce::Graphics& graphics, juce::Rectangle<int> area)
 {
-    for (const SpanIndex::Span& stretch : m_view.change().withoutSound()) {
-        const Columns columns = LaneBlocks::columnsOf(stretch, m_view.scale(), getWidth());
-        if (columns.end <= 0 || columns.first >= getWidth())
-            continue;
+    const auto& stretches = m_view.change().withoutSound();
+    const auto first = std::ranges::lower_bound(stretches, m_view.scale().secondsAt(-1.0), {}, &SpanIndex::Span::end);
+    for (auto stretch = first; stretch != stretches.end(); ++stretch) {
+        const Columns columns = LaneBlocks::columnsOf(*stretch, m_view.scale(), getWidth());
+        if (columns.first >= getWidth())
+            break;
         graphics.setTiledImageFill(m_hatch, 0, 0, 1.0F);
         graphics.fillRect(columns.first, area.getY(), columns.count(), area.getHeight());
     }
@@ -297,7 +300,9 @@ void TrackLanes::paintStills(juce::Graphics& graphics, const TrackRow& row, stan
         if (!graphics.reduceClipRegion(left, area.getY(), right - left, area.getHeight()))
             continue;
         const double place = event.sourceOffset() + std::max(starts[shot] - span.start, 0.0);
-        const auto frame = static_cast<std::uint32_t>(std::max(std::floor((place + standin::SameInstant) * rate), 0.0));
+        const auto frame =
+            static_cast<std::uint32_t>(std::clamp(std::floor((place + standin::SameInstant) * rate), 0.0,
+                                                  static_cast<double>(std::numeric_limits<std::uint32_t>::max())));
         const int height = static_cast<int>(std::ceil(static_cast<float>(area.getHeight()) * pixelScale));
         const juce::Image still = stills->still(*clip, frame, height);
         if (!still.isValid())
@@ -376,7 +381,7 @@ void TrackLanes::paintLines(juce::Graphics& graphics)
     const double pixel = m_view.scale().pixelAt(preview);
     if (pixel < getWidth()) {
         graphics.setColour(toColour(Palette::orange).withAlpha(0.035F));
-        const int first = std::max(0, static_cast<int>(std::floor(pixel)));
+        const int first = static_cast<int>(std::max(std::floor(pixel), 0.0));
         graphics.fillRect(first, 0, getWidth() - first, getHeight());
     }
     if (project.locatorLeft().getValue() < project.locatorRight().getValue()) {

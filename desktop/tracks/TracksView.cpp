@@ -299,6 +299,8 @@ TracksView::Times TracksView::times() const
 void TracksView::timerCallback()
 {
     guardSystem([&] {
+        if (!isShowing())
+            return;
         if (m_stills && m_stills->poll())
             m_lanes->repaint();
         const Times now = times();

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cmath>
 #include <limits>
+#include <utility>
 
 using namespace Velmark;
 
@@ -47,6 +48,12 @@ IFilePath* MediaClip::getFile()
     if (!m_file || m_file->path() != m_path)
         m_file = makeCounted<FilePath>(m_path);
     return m_file.get();
+}
+
+void MediaClip::setPath(std::u16string path)
+{
+    m_path = std::move(path);
+    markContentChanged();
 }
 
 void MediaClip::setFileRate(double framesPerSecond)

@@ -29,6 +29,8 @@ public:
     ProjectLink* link() const override;
     Kind kind() const { return m_kind; }
     const std::u16string& path() const { return m_path; }
+    /// When the project is stored in another folder.
+    void setPath(std::u16string path);
     double seconds() const { return length(); }
     /// Of the file, in frames per second; 0 when it isn't known, as it is of sound.
     double fileRate() const { return m_fileRate; }

@@ -31,8 +31,15 @@ public:
 
     virtual ~UserBoxes() = default;
 
-    /// Waits for the user. The index of the button that was used; there is at least one.
-    virtual std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons) = 0;
+    /// Waits for the user. The index of the button that was used; there is at least one. Escape uses the last one, and Return
+    /// that of index `byReturn`. Neither may be one that loses something.
+    virtual std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons,
+                            std::size_t byReturn) = 0;
+    /// The same; Return uses the first one.
+    std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons)
+    {
+        return ask(message, buttons, 0);
+    }
     /// Waits for the user. The full paths; none when the user cancels.
     virtual std::vector<std::u16string> chooseFiles(const FileQuestion& question) = 0;
     /// Shows the progress of the one operation that goes on, anew in each call. Whether the user has cancelled it.

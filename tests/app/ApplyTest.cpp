@@ -254,6 +254,20 @@ TEST(Apply, TheAutomationGoesAlong)
     }
 }
 
+TEST(Apply, AProjectInAnotherFolderLeadsToTheSameMedia)
+{
+    const Scene scene(Origins[0]);
+    const std::filesystem::path folder = scene.folder / "";
+    std::filesystem::create_directory(folder / "out");
+
+    ASSERT_EQ(scene.apply({"-o", folder / "result.stage"}).status, 0);
+    ASSERT_EQ(scene.apply({"-o", folder / "out/result.stage"}).status, 0);
+
+    EXPECT_EQ(named(json::parse(contentOf(folder / "result.stage")).at("pool"), "boom").at("path"), "boom.wav");
+    EXPECT_EQ(named(json::parse(contentOf(folder / "out/result.stage")).at("pool"), "boom").at("path"),
+              (folder / "boom.wav").string());
+}
+
 TEST(Apply, TheReportTellsWhatBecameOfEachClip)
 {
     for (const Origin origin : Origins) {

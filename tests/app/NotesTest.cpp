@@ -995,7 +995,7 @@ TEST(Notes, WhereNothingHasChangedALineThatWasPassedOverInOneCutAloneIsPointedTo
     const Cuts withLeader(shot, leader + shot);
     const Cuts same(leader + shot, leader + shot);
     const std::vector<std::string> rate{"--rate", "24 fps"};
-    const std::string hint = "Nothing has changed in what could be read; see below.";
+    const std::string hint = "Nothing has changed in the picture that could be read; see below.";
 
     const std::string text = withLeader.notes(rate).out;
     EXPECT_NE(text.find("\n" + hint + "\n"), std::string::npos) << text;
@@ -1077,6 +1077,72 @@ TEST(Notes, AReelThatWaitsAtAFreePlaceSaysSo)
     EXPECT_NE(text.find("   3  01:20:00:00  move all of reel 2 to 01:10:00:00 "), std::string::npos) << text;
     EXPECT_EQ(notes.at("reels")[0].at("rows")[0].at("changes")[0].at("outOfTheWay"), true);
     EXPECT_EQ(text.find("moved by step"), std::string::npos) << text;
+    EXPECT_NE(text.find("\nReel 2, 01:10:00:00, began at 01:00:00:00, out of the way since step 1\n"),
+              std::string::npos)
+        << text;
+}
+
+TEST(Notes, AReelThatWaitsUntilItIsGoneSaysSo)
+{
+    const std::string gone = cut("002", "B", "00:00:00:00 00:04:00:00", "01:10:00:00 01:14:00:00");
+    const std::string shot = cut("001", "A", "00:00:00:00 00:04:00:00", "01:00:00:00 01:04:00:00");
+    const Cuts film(shot + gone, shot + cut("002", "N", "00:00:00:00 00:08:00:00", "01:04:00:00 01:12:00:00"));
+    const std::vector<std::string> rate{"--rate", "24 fps"};
+
+    const std::string text = film.notes(rate).out;
+
+    EXPECT_NE(text.find("   1  01:10:00:00  move all of reel 2 to 01:20:00:00                 00:00:00:00\n"
+                        "      00:10:00:00 later                  the whole reel\n"
+                        "        out of the way until it is gone\n"),
+              std::string::npos)
+        << text;
+    EXPECT_NE(text.find("\nReel 2, 01:10:00:00, is gone, out of the way since step 1\n"), std::string::npos) << text;
+}
+
+TEST(Notes, ANewReelThatFirstStandsAtAFreePlaceSaysSoInEachForm)
+{
+    const std::string a = cut("001", "A", "00:00:00:00 00:20:00:00", "01:00:00:00 01:20:00:00");
+    const Cuts film(a + cut("002", "B", "00:00:00:00 00:20:00:00", "01:20:00:00 01:40:00:00") +
+                        cut("003", "C", "00:00:00:00 00:20:00:00", "01:40:00:00 02:00:00:00"),
+                    a + cut("002", "B", "00:00:00:00 00:20:00:00", "01:30:00:00 01:50:00:00") +
+                        cut("003", "C", "00:00:00:00 00:20:00:00", "02:10:00:00 02:30:00:00"));
+    const std::vector<std::string> rate{"--rate", "24 fps"};
+    const std::string place = "in the old cut at 01:20:00:00, at a free place until its reel's steps";
+    const std::string title = "Reel 2, 01:30:00:00, is new, out of the way since step 1";
+
+    const std::string text = film.notes(rate).out;
+    const json notes = json::parse(film.file(".json", rate));
+    const std::string page = film.file(".html", rate);
+    film.file(".pdf", rate);
+    const std::string paper = unbroken(textOfPdf(film.folder / "notes.pdf"));
+
+    EXPECT_NE(text.find("   1  01:20:00:00  move 00:20:00:00 to 02:40:00:00 "), std::string::npos) << text;
+    EXPECT_NE(text.find("\n        " + place + "\n"), std::string::npos) << text;
+    EXPECT_NE(text.find("\n" + title + "\n"), std::string::npos) << text;
+    EXPECT_NE(text.find("   3  02:40:00:00  move all of reel 2 to 01:30:00:00 "), std::string::npos) << text;
+    EXPECT_NE(paper.find(place), std::string::npos) << paper;
+    EXPECT_NE(paper.find(title), std::string::npos) << paper;
+    EXPECT_NE(page.find("at a free place until its reel"), std::string::npos);
+    EXPECT_NE(page.find(title), std::string::npos);
+    EXPECT_NE(film.file(".csv", rate).find(place), std::string::npos);
+    const json& rows = notes.at("reels")[0].at("rows");
+    EXPECT_EQ(rows[1].at("changes")[0].at("outOfTheWay"), true) << rows;
+    EXPECT_FALSE(rows[2].at("changes")[0].contains("outOfTheWay")) << rows;
+}
+
+TEST(Notes, AFilmThatFillsTheDaySaysThatOneReelLiesOnAnother)
+{
+    const std::string first = cut("001", "A", "00:00:00:00 11:50:00:00", "00:00:00:00 11:50:00:00");
+    const std::string second = cut("002", "B", "00:00:00:00 11:50:00:00", "12:00:00:00 23:50:00:00");
+    const Cuts film(first + second, cut("001", "B", "00:00:00:00 11:50:00:00", "00:00:00:00 11:50:00:00") +
+                                        cut("002", "A", "00:00:00:00 11:50:00:00", "12:00:00:00 23:50:00:00"));
+
+    const std::string text = unbroken(film.notes({"--rate", "24 fps"}).out);
+
+    EXPECT_NE(text.find("one of them lies on another for a moment, since the day has no free place for it."),
+              std::string::npos)
+        << text;
+    EXPECT_EQ(text.find("none ever lies on another"), std::string::npos) << text;
 }
 
 TEST(Notes, CutsThatShareNothingAreReplacedAsAWhole)

@@ -16,6 +16,7 @@
 #include "velmark/UserInterface.h"
 
 #include <algorithm>
+#include <string_view>
 
 namespace cadrel::host::tests {
 
@@ -238,7 +239,9 @@ public:
     uint32 changeFlags() override { return node().changeFlags(); }
     int32 setAttribute(const char* key, const FVariant& value, bool persistent) override
     {
-        return orRefusal([&] { return node().setAttribute(key, value, persistent); });
+        const auto set = [&] { return node().setAttribute(key, value, persistent); };
+        // A point that takes no mark stands where it should and stays, and nobody is told.
+        return std::string_view(key) == AttributeKey::HeldValue ? orNone(set) : orRefusal(set);
     }
     int32 getAttribute(const char* key, FVariant& value) override
     {

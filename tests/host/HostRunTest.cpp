@@ -314,13 +314,16 @@ TEST_P(HostRunTest, IsNotNotedWhenTheUserCancelsIt)
     EXPECT_FALSE(core::RunRecord::find(host.model()));
 }
 
-TEST_P(HostRunTest, ANoteThatCannotBeReadDoesNotKeepItFromBeingDone)
+TEST_P(HostRunTest, ANoteThatCannotBeReadDoesNotKeepItFromBeingDoneAndStaysAsItIs)
 {
     host.model().setProperty(core::PropertyKey::DoneRuns, core::Variant("no bytes of runs"));
     host.conform();
 
     EXPECT_EQ(heard.results, Results{Result::Ok});
-    EXPECT_TRUE(core::RunRecord::find(host.model()));
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    core::Variant note;
+    ASSERT_EQ(host.model().getProperty(core::PropertyKey::DoneRuns, note), Result::Ok);
+    EXPECT_EQ(note.toText(), "no bytes of runs");
 }
 
 TEST_P(HostRunTest, APreviewIsNoRun)

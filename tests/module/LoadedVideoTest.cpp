@@ -8,8 +8,8 @@
 #include "standin/project/Project.h"
 #include "standin/video/Videos.h"
 
-#include "examples/burnin/BurntInFrame.h"
 #include "tests/module/LoadedModule.h"
+#include "tests/module/MainStills.h"
 #include "tests/module/StoredProject.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/core/TestProject.h"
@@ -18,7 +18,6 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstdint>
 #include <filesystem>
 #include <optional>
@@ -30,9 +29,9 @@ using cadrel::core::EventBase;
 using cadrel::core::Framerate;
 using cadrel::core::Timecode;
 using cadrel::core::VideoList;
-using cadrel::examples::BurntInFrame;
 using cadrel::gui::MainButton;
 using cadrel::gui::MainLayout;
+using cadrel::tests::MainStills;
 using cadrel::tests::StoredModel;
 using cadrel::tests::TempFolder;
 using cadrel::tests::treePath;
@@ -101,42 +100,13 @@ protected:
     }
     void selectFirstChange() { click(m_layout->table(cadrel::core::ListKind::Change), 60, 30); }
 
-    /// The number in the bars of a still of the window, which stands in the middle of an area and keeps its shape; -1 when
-    /// there are none.
-    int numberIn(const MainLayout::Box& area) const
-    {
-        constexpr int Dark = 0x40;
-        constexpr int Bright = 0xc0;
-        const double scale = std::min(area.width / 320.0, area.height / 180.0);
-        const double left = area.x + area.width / 2.0 - 160.0 * scale;
-        const double top = area.y + area.height / 2.0 - 90.0 * scale;
-        const double y = top + 180.0 * scale * (1.0 + BurntInFrame::BarsTop) / 2.0;
-        int number = 0;
-        for (int bar = 0; bar < BurntInFrame::Bars; ++bar) {
-            const double x = left + 320.0 * scale * (bar + 0.5) / BurntInFrame::Bars;
-            const unsigned long colour =
-                m_windows.colourAt(WindowLeft + static_cast<int>(x), WindowTop + static_cast<int>(y));
-            const auto green = static_cast<int>(colour >> 8 & 0xff);
-            if (green > Dark && green < Bright)
-                return -1;
-            number = 2 * number + (green >= Bright ? 1 : 0);
-        }
-        return number;
-    }
-    MainLayout::Box still(bool isNew) const
-    {
-        const MainLayout::Box video = m_layout->video();
-        const int half = (video.height - 155) / 2;
-        return {video.x + 8, video.y + (isNew ? half + 135 : 95), video.width - 16, half - 20};
-    }
-    int oldNumber() const { return numberIn(still(false)); }
-    int newNumber() const { return numberIn(still(true)); }
     void expectStills(const Timecode& oldTime, const Timecode& newTime, int shift, std::size_t event)
     {
         const int oldFrame = oldTime.toFrameCount() - ProgrammeStart + shift;
         const int newFrame = newTime.toFrameCount() - ProgrammeStart + shift;
-        if (!turnUntil([&] { return oldNumber() == oldFrame && newNumber() == newFrame; }))
-            ADD_FAILURE() << "event " << event << " shows " << oldNumber() << " and " << newNumber()
+        const MainStills stills(m_windows, *m_layout, WindowLeft, WindowTop);
+        if (!turnUntil([&] { return stills.oldNumber() == oldFrame && stills.newNumber() == newFrame; }))
+            ADD_FAILURE() << "event " << event << " shows " << stills.oldNumber() << " and " << stills.newNumber()
                           << " in the place of " << oldFrame << " and " << newFrame;
     }
 

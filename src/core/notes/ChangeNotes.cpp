@@ -31,6 +31,7 @@ ChangeNotes::ChangeNotes(const EventList& oldEvents, const EventList& newEvents,
 {
     const StepChanges changes(m_oldCut, m_newCut);
     StepList list = makeSteps(m_oldCut, m_newCut, findKeptStretches(m_oldCut, m_newCut), m_framerate);
+    m_isOverfull = list.isOverfull;
     for (std::size_t reel = 0; reel < list.reels.size(); ++reel) {
         joinTrims(list.rows[reel], simplify, changes);
         ReelNotes notes;
@@ -55,8 +56,8 @@ void ChangeNotes::number()
             if (const NoteStep* const step = entry.step()) {
                 entry.number = ++m_totals.steps;
                 entry.lengthChange = step->lengthChange();
-                if (step->action == StepAction::MoveReel && step->place.reel != reel)
-                    m_reels[step->place.reel].movedBy = step->changes.front().isOutOfTheWay ? 0 : entry.number;
+                if (step->place.reel != reel)
+                    tellWhoMoved(m_reels[step->place.reel], entry);
                 if (step->action == StepAction::Move && step->from.reel != step->place.reel) {
                     const std::size_t other = step->from.reel == reel ? step->place.reel : step->from.reel;
                     entry.lengthChange = step->place.reel == reel ? step->moved : -step->moved;
@@ -70,6 +71,18 @@ void ChangeNotes::number()
                 end->step = betweenReels.at(end->move.inOld->start);
             entry.runningOffset = offsets[reel];
         }
+    }
+}
+
+/// Of a reel into or with which a step of an earlier one has moved picture.
+void ChangeNotes::tellWhoMoved(ReelNotes& reel, const NoteEntry& entry)
+{
+    const bool isOutOfTheWay = entry.step()->changes.front().isOutOfTheWay;
+    if (entry.step()->action == StepAction::MoveReel) {
+        reel.movedBy = isOutOfTheWay ? 0 : entry.number;
+        reel.asideSince = isOutOfTheWay ? entry.number : 0;
+    } else if (isOutOfTheWay && reel.asideSince == 0) {
+        reel.asideSince = entry.number;
     }
 }
 

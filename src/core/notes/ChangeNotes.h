@@ -44,8 +44,8 @@ struct ReelNotes {
     ReelChange pair;
     std::int32_t before = 0;
     std::int32_t after = 0;
-    std::size_t movedBy =
-        0; ///< the step of an earlier reel that has moved all of this one to its new place; 0 for none
+    std::size_t movedBy = 0;    ///< the step of an earlier reel that has moved all of it to its new place; 0 for none
+    std::size_t asideSince = 0; ///< the step of an earlier reel since which it has stood at a free place; 0 for none
     std::vector<NoteEntry> entries;
 
     /// Whether all of its picture stands where it stood.
@@ -75,6 +75,8 @@ public:
     const NoteTotals& totals() const { return m_totals; }
     /// The steps that change the most frames, the largest first.
     std::vector<const NoteEntry*> largestSteps() const;
+    /// Whether one reel lies on another for a moment where all are on one timeline, since the day has no free place.
+    bool isOverfull() const { return m_isOverfull; }
     /// How many steps were joined into others.
     std::size_t joinedSteps() const;
 
@@ -87,6 +89,7 @@ public:
 
 private:
     void number();
+    static void tellWhoMoved(ReelNotes& reel, const NoteEntry& entry);
     void count();
 
     Framerate m_framerate;
@@ -95,6 +98,7 @@ private:
     Programme m_newCut;
     std::vector<ReelNotes> m_reels;
     NoteTotals m_totals;
+    bool m_isOverfull = false;
 };
 
 HealingNotes notesOfHealing(const EventList& changeEdl);

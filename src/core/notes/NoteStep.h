@@ -53,7 +53,8 @@ struct PictureChange {
     bool isPart = false;                ///< of a lift: the rest of the shot stays somewhere
     bool hasOldTransition = false;      ///< the dissolve or wipe of the old shot goes with it
     bool hasNewTransition = false;      ///< the new shot brings its dissolve or wipe
-    bool isOutOfTheWay = false;         ///< of a reel: it goes to a free place, from where it is moved on
+    bool isOutOfTheWay = false; ///< of a reel: it goes to a free place, where it waits for its own steps; of moved
+                                ///< picture: it goes into a reel that stands at such a place
 };
 
 /// Where frames are in the programme as it is when all steps before have been carried out.

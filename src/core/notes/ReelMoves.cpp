@@ -18,7 +18,7 @@ namespace {
 class ReelMover {
 public:
     ReelMover(StepList& list, const Programme& oldCut, const Programme& newCut, const Framerate& framerate)
-        : m_list(list), m_oldCut(oldCut), m_newCut(newCut), m_timeline(courses(), framerate)
+        : m_list(list), m_oldCut(oldCut), m_newCut(newCut), m_timeline(timelineAt(framerate))
     {
     }
 
@@ -34,6 +34,7 @@ public:
                         std::make_move_iterator(m_list.rows[reel].end()));
             m_list.rows[reel] = std::move(rows);
         }
+        m_list.isOverfull = m_timeline.hasNoRoom();
     }
 
 private:
@@ -49,32 +50,46 @@ private:
         return place ? &m_newCut.reels()[*place] : nullptr;
     }
 
-    std::vector<ReelCourse> courses() const
+    std::vector<ReelCourse> coursesBeforeTheSteps() const
     {
         std::vector<ReelCourse> courses(m_list.reels.size());
-        std::vector<std::int32_t> lengths(courses.size(), 0);
         for (std::size_t reel = 0; reel < courses.size(); ++reel) {
+            courses[reel].lengths.push_back({0, 0});
             if (const Reel* const was = oldReelOf(reel)) {
                 courses[reel].oldStart = was->timecodeStart;
-                lengths[reel] = courses[reel].mostEver = was->length;
+                courses[reel].lengths.front().frames = was->length;
             }
             if (const Reel* const is = newReelOf(reel))
                 courses[reel].newStart = is->timecodeStart;
         }
-        for (std::size_t reel = 0; reel < courses.size(); ++reel) {
-            courses[reel].mostBefore = courses[reel].mostEver;
-            for (const NoteRow& row : m_list.rows[reel]) {
+        return courses;
+    }
+
+    ReelTimeline timelineAt(const Framerate& framerate) const
+    {
+        std::vector<ReelCourse> courses = coursesBeforeTheSteps();
+        std::vector<std::size_t> turns;
+        std::size_t moment = 0;
+        const auto grow = [&](std::size_t reel, std::int32_t frames) {
+            std::vector<ReelLength>& lengths = courses[reel].lengths;
+            if (frames == 0)
+                return;
+            if (lengths.back().moment != moment)
+                lengths.push_back({moment, lengths.back().frames});
+            lengths.back().frames += frames;
+        };
+        for (const auto& rows : m_list.rows) {
+            turns.push_back(moment++);
+            for (const NoteRow& row : rows) {
                 const auto* const step = std::get_if<NoteStep>(&row);
                 if (step == nullptr)
                     continue;
-                // What is moved is out of its reel before it is in the other one.
-                lengths[step->from.reel] -= step->moved;
-                lengths[step->place.reel] += step->moved + step->lengthChange();
-                ReelCourse& course = courses[step->place.reel];
-                course.mostEver = std::max(course.mostEver, lengths[step->place.reel]);
+                grow(step->from.reel, -step->moved);
+                grow(step->place.reel, step->moved + step->lengthChange());
+                ++moment;
             }
         }
-        return courses;
+        return ReelTimeline(std::move(courses), std::move(turns), framerate);
     }
 
     NoteStep stepOf(const ReelShift& shift) const
@@ -109,6 +124,8 @@ private:
         tell(step->from);
         for (WorkPlace& place : step->doubledFrom)
             tell(place);
+        if (step->action == StepAction::Move)
+            step->changes.front().isOutOfTheWay = m_timeline.isAside(step->place.reel);
     }
 
     StepList& m_list;

@@ -15,6 +15,7 @@ class StepChanges;
 struct StepList {
     std::vector<ReelChange> reels;
     std::vector<std::vector<NoteRow>> rows; ///< of each pair of reels
+    bool isOverfull = false;                ///< the day has no free place for a reel that would be in another's way
 };
 
 /// Makes as few steps as possible that keep all picture of `kept`: between two kept stretches one, whatever is deleted and

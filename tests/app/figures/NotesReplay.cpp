@@ -72,10 +72,12 @@ void NotesReplay::check(bool isRight, const std::string& what, const json& where
         m_faults.push_back(what + ": " + where.dump());
 }
 
-/// The reel of a place whose figures agree.
+/// The reel of a place whose figures agree. An empty reel begins where its first picture is put.
 std::size_t NotesReplay::placeIn(const json& place)
 {
     const auto reel = static_cast<std::size_t>(intOf(place, "reel") - 1);
+    if (m_tables.at(reel).empty())
+        m_bases.at(reel) = timeOf(place.at("timecode")) - intOf(place, "frame");
     check(timeOf(place.at("timecode")) == m_bases.at(reel) + intOf(place, "frame"), "timecode of a place", place);
     if (place.contains("feet")) {
         const int frame = intOf(place, "frame");
@@ -127,9 +129,6 @@ void NotesReplay::lookAtMoveEnd(const json& row, std::size_t reel)
 void NotesReplay::carryOut(const json& step, std::size_t reel)
 {
     check(intOf(step, "number") == ++m_steps, "number", step);
-    const auto target = static_cast<std::size_t>(intOf(step.at("at"), "reel") - 1);
-    if (step.at("action") != "move-reel" && m_tables.at(target).empty())
-        m_bases.at(target) = timeOf(step.at("at").at("timecode")) - intOf(step.at("at"), "frame");
     const int before = static_cast<int>(m_tables[reel].size());
     m_removed.clear();
     m_inserted.clear();
@@ -164,6 +163,7 @@ void NotesReplay::moveReel(const json& step)
 {
     const auto reel = static_cast<std::size_t>(intOf(step.at("at"), "reel") - 1);
     check(placeIn(step.at("from")) == reel && intOf(step.at("from"), "frame") == 0, "where a reel began", step);
+    check(!m_tables.at(reel).empty(), "a reel without picture is moved", step);
     m_bases.at(reel) += intOf(step.at("changes").at(0), "frames");
     check(placeIn(step.at("at")) == reel && intOf(step.at("at"), "frame") == 0, "where a reel begins", step);
     m_extents[m_steps] = 0;

@@ -409,7 +409,9 @@ PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
         return {"replaced " + time, name,
                 withoutComma(materialOf(change) + newTransition + ", was " + oldName + at() + oldTransition)};
     if (kind == "moved")
-        return {"moved " + time, withMore(name, moreShots), "in the old cut" + at()};
+        return {"moved " + time, withMore(name, moreShots),
+                "in the old cut" + at() +
+                    (change.contains("outOfTheWay") ? ", at a free place until its reel's steps" : "")};
     if (kind == "unchanged")
         return {"unchanged " + time, withMore(name, moreShots), {}};
     if (kind == "doubled")
@@ -431,7 +433,9 @@ PrintedNotes::Words PrintedNotes::wordsOf(const json& change) const
     }
     if (kind == "reel-moved")
         return {time + (frames < 0 ? " earlier" : " later"), "the whole reel",
-                change.contains("outOfTheWay") ? "out of the way until its own steps" : ""};
+                !change.contains("outOfTheWay") ? ""
+                : change.contains("new")        ? "out of the way until its own steps"
+                                                : "out of the way until it is gone"};
     if (kind == "version-changed")
         return {"was " + cutTo(was.at(matched), 28), cutTo(now.at(matched), ColumnsOfAName), {}};
     if (kind == "transition-added")
@@ -641,13 +645,19 @@ std::string PrintedNotes::reelList(Form form) const
     return text;
 }
 
-/// The last step that has moved all of a reel, where it stands among those of another.
+/// The last step of an earlier reel that has moved all of a reel, or else the first one that has moved picture into it at a
+/// free place.
 std::string PrintedNotes::moverOf(std::size_t reel) const
 {
     std::string text;
     for (const auto& [number, step] : m_steps) {
-        if (step.row->at("action") == "move-reel" && step.row->at("at").at("reel") == static_cast<int>(reel) + 1)
-            text = step.reel == reel ? std::string() : std::string(", moved by step ").append(std::to_string(number));
+        const json& row = *step.row;
+        const bool isMove = row.at("action") == "move";
+        const bool isAside = row.at("changes")[0].contains("outOfTheWay");
+        if (step.reel == reel || row.at("at").at("reel") != static_cast<int>(reel) + 1)
+            continue;
+        if (row.at("action") == "move-reel" || (isMove && isAside && text.empty()))
+            text = (isAside ? ", out of the way since step " : ", moved by step ") + std::to_string(number);
     }
     return text;
 }
@@ -661,7 +671,8 @@ std::string PrintedNotes::reelHeading(std::size_t reel, Form form) const
     else if (pair.at("old").is_null())
         text += ", is new";
     else if (pair.at("old").at("start") != pair.at("new").at("start"))
-        text += ", began at " + pair.at("old").at("start").get<std::string>() + moverOf(reel);
+        text += ", began at " + pair.at("old").at("start").get<std::string>();
+    text += moverOf(reel);
     const int before = framesOf(reel, "old");
     const int after = framesOf(reel, "new");
     const bool isUnchanged = std::all_of(pair.at("rows").begin(), pair.at("rows").end(),

@@ -955,6 +955,9 @@ TEST_F(ChangeNotesTest, ReelsThatChangePlacesGoOverAFreeOne)
 
     // The last one ends at 76 minutes.
     EXPECT_EQ(movesOf(film), (Texts{"reel 2 to 80~", "reel 1 to 60", "reel 2 to 70"}));
+    EXPECT_EQ(film.notes.reels()[0].asideSince, 0U);
+    EXPECT_EQ(film.notes.reels()[1].asideSince, 1U);
+    EXPECT_EQ(film.notes.reels()[1].movedBy, 0U);
 }
 
 TEST_F(ChangeNotesTest, AReelWaitsElsewhereWhileTheOneBeforeItIsLongerForAMoment)
@@ -965,7 +968,7 @@ TEST_F(ChangeNotesTest, AReelWaitsElsewhereWhileTheOneBeforeItIsLongerForAMoment
     const Notes film(timelineOf({{60, was}, {70, second}}), timelineOf({{60, is}, {70, second}}));
 
     EXPECT_EQ(movesOf(film), (Texts{"reel 2 to 80~", ".", ".", "reel 2 to 70"}));
-    // At 72 minutes it isn't in the way: reel 1 has 11 minutes between its steps.
+    // At 71 minutes it isn't in the way: reel 1 has 11 minutes between its steps.
     EXPECT_EQ(movesOf(Notes(timelineOf({{60, was}, {71, second}}), timelineOf({{60, is}, {71, second}}))),
               (Texts{".", "."}));
 }
@@ -989,6 +992,59 @@ TEST_F(ChangeNotesTest, AReelThatIsGoneIsTakenOutBeforeALaterOneComesToItsPlace)
                      timelineOf({{60, {{"A", 0, Minute}}}, {70, last}}));
 
     EXPECT_EQ(movesOf(film), (Texts{".", "reel 3 to 70"}));
+}
+
+TEST_F(ChangeNotesTest, AReelThatHasLostAllOfItsPictureIsNotMoved)
+{
+    const std::vector<Shot> second{{"B", 0, 8 * Minute}};
+    const Notes film(timelineOf({{60, {{"A", 0, 9 * Minute}}}, {100, second}, {120, {{"C", 0, 9 * Minute}}}}),
+                     timelineOf({{60, {{"A", 0, 9 * Minute}, {"C", 0, 9 * Minute}}}, {120, second}}));
+    const Notes refilled(timelineOf({{60, {{"A", 0, 9 * Minute}}}, {120, {{"C", 0, 9 * Minute}}}}),
+                         timelineOf({{60, {{"A", 0, 9 * Minute}, {"C", 0, 9 * Minute}}}, {130, second}}));
+
+    EXPECT_EQ(movesOf(film), (Texts{".", "reel 2 to 120"}));
+    EXPECT_EQ(movesOf(refilled), (Texts{".", "."}));
+    EXPECT_EQ(refilled.steps()[1].place.timecode(), 130 * Minute);
+}
+
+TEST_F(ChangeNotesTest, ReelsThatBecomeOneAreNotMovedOutOfItsWay)
+{
+    const Shot a{"A", 0, 20 * Minute};
+    const Shot b{"B", 0, 20 * Minute};
+    const Shot c{"C", 0, 20 * Minute};
+    const Notes apart(timelineOf({{60, {a}}, {90, {b}}, {120, {c}}}), timelineOf({{60, {a, b, c}}}));
+
+    // With both, reel 1 ends where reel 3 began.
+    EXPECT_EQ(movesOf(apart), (Texts{".", "."}));
+}
+
+TEST_F(ChangeNotesTest, TheSecondHalfOfAReelBecomesAReelInOneStep)
+{
+    const Shot a{"A", 0, 18 * Minute};
+    const Shot b{"B", 0, 18 * Minute};
+    const Notes film(timelineOf({{60, {a, b}}}), timelineOf({{60, {a}}, {80, {b}}}));
+
+    EXPECT_EQ(movesOf(film), Texts{"."});
+    EXPECT_FALSE(film.steps()[0].changes.front().isOutOfTheWay);
+    EXPECT_EQ(film.notes.reels()[1].asideSince, 0U);
+}
+
+TEST_F(ChangeNotesTest, ANewReelWhosePlaceIsTakenGetsItsPictureAtAFreeOneAndSaysSo)
+{
+    const Shot a{"A", 0, 20 * Minute};
+    const Shot b{"B", 0, 20 * Minute};
+    const Shot c{"C", 0, 20 * Minute};
+    const Notes film(timelineOf({{60, {a, b, c}}}), timelineOf({{60, {a}}, {90, {b}}, {130, {c}}}));
+
+    // C reaches to 100 minutes when B is taken out, and the last reel ends at 150.
+    EXPECT_EQ(movesOf(film), (Texts{".", ".", "reel 2 to 90"}));
+    EXPECT_EQ(film.steps()[0].place.timecode(), 160 * Minute);
+    EXPECT_TRUE(film.steps()[0].changes.front().isOutOfTheWay);
+    EXPECT_EQ(film.steps()[1].place.timecode(), 130 * Minute);
+    EXPECT_FALSE(film.steps()[1].changes.front().isOutOfTheWay);
+    EXPECT_EQ(film.notes.reels()[1].asideSince, 1U);
+    EXPECT_EQ(film.notes.reels()[2].asideSince, 0U);
+    EXPECT_FALSE(film.notes.isOverfull());
 }
 
 /// A film of reels of one shot, each at its hour.

@@ -16,6 +16,7 @@
 #include <algorithm>
 #include <filesystem>
 #include <memory>
+#include <optional>
 #include <stdexcept>
 #include <string>
 #include <utility>
@@ -110,6 +111,18 @@ EventList reelsOf(const std::vector<std::pair<int, int>>& startsAndLengths)
     return events;
 }
 
+/// Moves all of a reel from one frame of the day to another.
+NoteStep shiftOf(std::size_t reel, int from, int to)
+{
+    NoteStep step;
+    step.action = StepAction::MoveReel;
+    step.from = {reel, 0, from};
+    step.place = {reel, 0, to};
+    step.changes.resize(1);
+    step.changes[0].frames = to - from;
+    return step;
+}
+
 TEST(NotesPlayer, RefusesAStepThatLaysOneReelOnAnother)
 {
     const TestProject project(Framerate(25, 0));
@@ -118,17 +131,30 @@ TEST(NotesPlayer, RefusesAStepThatLaysOneReelOnAnother)
     NoteStep insert;
     insert.place = {0, 100, 90000};
     insert.inserted = {0, 1};
-    NoteStep shift;
-    shift.action = StepAction::MoveReel;
-    shift.from = {0, 0, 90000};
-    shift.place = {0, 0, 91900};
-    shift.changes.resize(1);
-    shift.changes[0].frames = 1900;
+    const NoteStep shift = shiftOf(0, 90000, 91900);
     NotesPlayer player(cut, cut, rules, {{0, 0}, {1, 1}});
 
     EXPECT_NO_THROW(player.carryOut(shift));
     insert.place.reelStart = 91900;
     EXPECT_THROW(player.carryOut(insert), std::logic_error);
+}
+
+TEST(NotesPlayer, RefusesToMoveAReelWithoutPicture)
+{
+    const TestProject project(Framerate(25, 0));
+    const PictureRules rules{project.framerate, MatchBy::RollName, {}};
+    NoteStep empty;
+    empty.place = {0, 0, 90000};
+    const NoteStep shift = shiftOf(0, 90000, 91900);
+    for (const int left : {0, 1}) {
+        NotesPlayer player(reelsOf({{90000, 100}}), reelsOf({{90000, 100}}), rules, {{0, 0}});
+        empty.removed = 100 - left;
+        player.carryOut(empty);
+        if (left == 0)
+            EXPECT_THROW(player.carryOut(shift), std::logic_error);
+        else
+            EXPECT_NO_THROW(player.carryOut(shift));
+    }
 }
 
 RC_GTEST_PROP(NotesLaw, TheStepsTurnTheOldCutIntoTheNewOne, ())
@@ -169,6 +195,65 @@ RC_GTEST_PROP(NotesLaw, OnOneTimelineNoReelLiesOnAnotherAtAnyMoment, ())
 
     RC_LOG() << wrong;
     RC_ASSERT(wrong.empty());
+}
+
+std::size_t countMovesOfReels(const StepList& list)
+{
+    std::size_t count = 0;
+    for (const auto& rows : list.rows)
+        count += static_cast<std::size_t>(std::count_if(rows.begin(), rows.end(), [](const NoteRow& row) {
+            const auto* const step = std::get_if<NoteStep>(&row);
+            return step != nullptr && step->action == StepAction::MoveReel;
+        }));
+    return count;
+}
+
+/// Carries the steps out with each reel moved right before its own steps, and only if it has picture that begins elsewhere in
+/// the new cut. How many reels are moved then; nothing where one reel lies on another.
+std::optional<std::size_t> movesOnTheirTurns(const RandomTimeline& film, const StepList& list)
+{
+    NotesPlayer player(film.oldCut, film.newCut, film.rules, list.reels);
+    const std::vector<SeenReel> newReels = framesOf(film.newCut, film.rules);
+    const auto goalOf = [&](std::size_t reel, int otherwise) {
+        const auto& newReel = list.reels[reel].newReel;
+        return newReel ? newReels.at(*newReel).start : otherwise;
+    };
+    std::size_t moves = 0;
+    try {
+        for (std::size_t reel = 0; reel < list.reels.size(); ++reel) {
+            const int goal = goalOf(reel, -1);
+            const int start = player.timecodeAt({reel, 0, goal});
+            if (goal >= 0 && start != goal) {
+                player.carryOut(shiftOf(reel, start, goal));
+                ++moves;
+            }
+            for (const NoteRow& row : list.rows[reel]) {
+                const auto* const step = std::get_if<NoteStep>(&row);
+                if (step == nullptr || step->action == StepAction::MoveReel)
+                    continue;
+                NoteStep onItsTurn = *step;
+                onItsTurn.place.reelStart = goalOf(step->place.reel, step->place.reelStart);
+                player.carryOut(onItsTurn);
+            }
+        }
+    } catch (const std::logic_error&) {
+        return std::nullopt;
+    }
+    return moves;
+}
+
+RC_GTEST_PROP(NotesLaw, NoReelIsMovedNeedlessly, ())
+{
+    const RandomTimeline film(*rc::gen::arbitrary<std::uint64_t>());
+    const TestProject project(film.rules.framerate);
+
+    const StepList list = stepsBetween(film.oldCut, film.newCut, film.rules);
+
+    const auto moves = movesOnTheirTurns(film, list);
+    RC_CLASSIFY(!moves, "reels in each other's way");
+    RC_CLASSIFY(moves == 0U, "no reel moves");
+    if (moves)
+        RC_ASSERT(countMovesOfReels(list) == *moves);
 }
 
 RC_GTEST_PROP(NotesLaw, OnOneTimelineTheOffsetsEndInTheChangeOfLength, ())

@@ -211,7 +211,7 @@ void NotesPlayer::carryOutAlone(const NoteStep& step)
         insert(step.place.frame, fromNewCut);
         break;
     case StepAction::MoveReel:
-        check(step.place.frame == 0 && step.changes.front().frames != 0 &&
+        check(!reel.empty() && step.place.frame == 0 && step.changes.front().frames != 0 &&
               step.from.timecode() == m_reels.at(step.from.reel).start);
         m_reels.at(step.place.reel).start += step.changes.front().frames;
         check(step.place.timecode() == m_reels.at(step.place.reel).start);
@@ -244,7 +244,8 @@ bool NotesPlayer::isDoneBefore(const core::WorkPlace& place) const
     const auto& [start, frames] = m_reels.at(place.reel);
     const auto& [goalStart, goal] = m_goal.at(place.reel);
     const auto count = static_cast<std::size_t>(place.frame);
-    return (start == goalStart || goal.empty()) && count <= frames.size() && count <= goal.size() &&
+    return ((frames.empty() ? place.reelStart : start) == goalStart || goal.empty()) && count <= frames.size() &&
+           count <= goal.size() &&
            std::equal(frames.begin(), frames.begin() + place.frame, goal.begin(),
                       [](const SeenFrame& a, const SeenFrame& b) { return a.looksLike(b); });
 }

@@ -283,7 +283,20 @@ void changeTimeline(std::vector<ReelOfShots>& reels, Random& random, int number)
     const auto placeIn = [&random](const ReelOfShots& shots) {
         return below(random, static_cast<int>(shots.size()) + 1);
     };
-    switch (below(random, 10)) {
+    switch (below(random, 12)) {
+    case 10:
+        if (&reel != &other) {
+            other.insert(other.end(), reel.begin(), reel.end());
+            reel.clear();
+        }
+        break;
+    case 11: {
+        const auto half = reel.begin() + placeIn(reel);
+        const ReelOfShots rest(half, reel.end());
+        reel.erase(half, reel.end());
+        reels.insert(reels.begin() + below(random, static_cast<int>(reels.size()) + 1), rest);
+        break;
+    }
     case 0:
         std::swap(reel, other);
         break;

@@ -13,6 +13,7 @@
 #include <algorithm>
 #include <chrono>
 #include <functional>
+#include <stdexcept>
 #include <string>
 #include <thread>
 #include <vector>
@@ -35,6 +36,8 @@ protected:
         m_button.onClick = [this] { ++m_clicks; };
         m_boxes.setOpenChanged([this](bool isOpen) { m_opened.push_back(isOpen); });
         m_loop.setIdle([this](bool isWaiting) {
+            if (std::chrono::steady_clock::now() > m_end)
+                throw std::runtime_error("no key ends the box");
             m_waitings.push_back(isWaiting);
             if (m_acts.empty() || m_isActing)
                 return;
@@ -88,6 +91,7 @@ protected:
     std::vector<bool> m_waitings;
     std::vector<std::function<void()>> m_acts;
     bool m_isActing = false;
+    std::chrono::steady_clock::time_point m_end = std::chrono::steady_clock::now() + std::chrono::seconds(60);
 };
 
 TEST_F(BoxesTest, AnswerTheFirstButtonOfAnAlertWithReturnAndTheLastWithEscape)
@@ -97,6 +101,8 @@ TEST_F(BoxesTest, AnswerTheFirstButtonOfAnAlertWithReturnAndTheLastWithEscape)
     willPress(juce::KeyPress::escapeKey);
     EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Remove", u"Cancel"}), 2U);
     EXPECT_EQ(m_opened, (std::vector<bool>{true, false, true, false}));
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Remove", u"Keep", u"Cancel"}, 1), 1U) << "The first one would lose something.";
     EXPECT_FALSE(m_boxes.isOpen());
 }
 
@@ -164,6 +170,16 @@ TEST_F(BoxesTest, AskBeforeAFileIsOverwritten)
 
     willType("cut");
     will([this] {
+        willPress(juce::KeyPress::returnKey);
+        willPress(juce::KeyPress::escapeKey);
+        m_isActing = false;
+        m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::returnKey));
+    });
+    EXPECT_EQ(save(), Files()) << "Return is no yes.";
+
+    willType("cut");
+    will([this] {
+        will([] { juce::Component::getCurrentlyFocusedComponent()->moveKeyboardFocusToSibling(false); });
         willPress(juce::KeyPress::returnKey);
         m_isActing = false;
         m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::returnKey));

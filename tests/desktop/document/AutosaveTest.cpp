@@ -177,8 +177,9 @@ TEST_F(AutosaveTest, OnAFullDiskIsToldAndLeavesTheFormerOne)
     EXPECT_EQ(contentOf(autosave), first);
     EXPECT_EQ(folder.names(), names);
 
-    renameTrack(document, u"C");
-    idle();
+    idle(seconds(29));
+    EXPECT_EQ(contentOf(autosave), first);
+    idle(seconds(1)); // the disk has room again, and the user does nothing
     EXPECT_EQ(document.autosaveFault(), "");
     EXPECT_NE(contentOf(autosave), first);
 }
@@ -327,7 +328,30 @@ TEST_F(AutosaveTest, SaysThatTheFileHasChangedSinceThen)
     OpenDocument& document = opened(Work::Recover);
     EXPECT_EQ(document.project().allTracks().size(), 1U);
     EXPECT_TRUE(document.isUnsaved());
-    EXPECT_TRUE(documents.save(document).isSaved());
+
+    const std::string foreign = contentOf(file);
+    EXPECT_EQ(documents.save(document).state, State::Changed);
+    EXPECT_EQ(contentOf(file), foreign);
+    EXPECT_EQ(documents.save(document).message,
+              file.string() + ": has been changed since the time of the recovered work");
+    EXPECT_TRUE(documents.overwrite(document).isSaved());
+    renameTrack(document, u"B");
+    EXPECT_TRUE(documents.save(document).isSaved()) << "From then on the file is its own.";
+}
+
+TEST_F(AutosaveTest, SaysThatTheFileHasChangedAfterASecondCrashAsWell)
+{
+    crash();
+    writeProject("reel3.stage", 2);
+    OpenDocument& document = opened(Work::Recover);
+    renameTrack(document, u"B");
+    idle();
+    const std::string left = contentOf(autosave);
+    documents.close(document);
+    writeFile(autosave, left);
+
+    ASSERT_TRUE(documents.look(file).unsavedWork);
+    EXPECT_TRUE(documents.look(file).unsavedWork->isOfFormerFile);
 }
 
 TEST_F(AutosaveTest, ThatIsNotWholeIsNeverOffered)
@@ -357,6 +381,10 @@ TEST_F(AutosaveTest, WithAnAbsurdHeadIsNeverOffered)
 {
     const std::string content = contentOf(file);
     const ContentPrint print = ContentPrint::of(content);
+    const auto readWith = [this](const std::string& written) {
+        writeFile(autosave, written);
+        return Autosave::read(file).has_value();
+    };
     for (const char* const head :
          {"", "null", "[]", "{}", "{\"path\":1}", R"({"path":"/a","form":"stage","fileSize":-1,"fileHash":"00"})"}) {
         writeFile(autosave, std::string("Cadrel autosave 1\n").append(head).append("\n").append(content));
@@ -364,6 +392,17 @@ TEST_F(AutosaveTest, WithAnAbsurdHeadIsNeverOffered)
     }
     writeFile(autosave, "Cadrel autosave 1\n" + std::string(100000, '[') + "\n" + content);
     EXPECT_FALSE(Autosave::read(file));
+
+    Autosave::write(file, print, content, Autosave::Time(std::chrono::seconds(1000)));
+    EXPECT_TRUE(Autosave::read(file));
+    const std::string whole = contentOf(autosave);
+    const std::string time = "\"time\":1000";
+    const std::size_t place = whole.find(time);
+    ASSERT_NE(place, std::string::npos) << whole.substr(0, 300);
+    for (const char* const absurd : {"-1", "9223372037", "9223372036854775806", "1e300"})
+        EXPECT_FALSE(readWith(std::string(whole).replace(place, time.size(), std::string("\"time\":").append(absurd))))
+            << absurd;
+    EXPECT_TRUE(readWith(std::string(whole).replace(place, time.size(), "\"time\":9223372036")));
     EXPECT_EQ(print.size, content.size());
 }
 

@@ -125,8 +125,9 @@ struct DocumentHost {
     TempFolder folder;
     standin::Application application;
     Velmark::Counted<StoringModule> module = Velmark::makeCounted<StoringModule>();
-    OpenDocuments documents{application};
     Clock::time_point now = Clock::now();
+    /// A loaded machine doesn't change when something is done: by this clock nothing takes any time.
+    OpenDocuments documents{application, nullptr, OpenDocuments::AutosaveInterval, [this] { return now; }};
 };
 
 class DocumentTest : public testing::Test, protected DocumentHost {};

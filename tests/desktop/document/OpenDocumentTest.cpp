@@ -162,6 +162,22 @@ TEST_F(OpenDocumentTest, AsksAModuleThatCannotStoreOnceAndThenOnlyWhenItIsSaved)
     EXPECT_EQ(module->storings, before + 2);
 }
 
+TEST_F(OpenDocumentTest, IsUnsavedBeforeClosingAsLongAsAModuleCannotStore)
+{
+    OpenDocument& document = opened();
+    EXPECT_FALSE(document.settleUnsaved());
+    module->canStore = false;
+    idle();
+    const int before = module->storings;
+    EXPECT_TRUE(document.settleUnsaved());
+    EXPECT_EQ(module->storings, before + 1) << "It is asked again, and tells the user.";
+
+    module->canStore = true;
+    EXPECT_FALSE(document.settleUnsaved());
+    module->models[&document.project()] = "settings";
+    EXPECT_TRUE(document.settleUnsaved());
+}
+
 TEST_F(OpenDocumentTest, LeavesModulesAloneWithinATransaction)
 {
     OpenDocument& document = opened();

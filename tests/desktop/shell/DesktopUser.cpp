@@ -3,7 +3,9 @@
 #include "tests/desktop/shell/DesktopUser.h"
 
 #include "desktop/shell/ShellLayout.h"
+#include "tests/module/MainStills.h"
 #include "tests/support/TreePaths.h"
+#include "tests/support/x11/XDrag.h"
 
 #include <X11/Xlib.h>
 #include <X11/Xutil.h>
@@ -14,11 +16,14 @@
 #include <cstdlib>
 #include <stdexcept>
 #include <thread>
+#include <utility>
 
 #include <sys/wait.h>
 #include <unistd.h>
 
 namespace desktop::tests {
+
+using cadrel::tests::WindowPlaces;
 
 namespace {
 
@@ -113,7 +118,7 @@ DesktopUser::DesktopUser(const std::filesystem::path& home, const std::vector<st
 DesktopUser::~DesktopUser()
 {
     if (!m_hasEnded) {
-        kill(m_process, SIGKILL);
+        killProgram();
         waitpid(m_process, nullptr, 0);
     }
     XCloseDisplay(m_display);
@@ -132,25 +137,97 @@ unsigned long DesktopUser::findWindow(unsigned long within) const
     return 0;
 }
 
-void DesktopUser::waitFor(const std::string& what, const std::function<bool()>& condition) const
+void DesktopUser::waitFor(const std::string& what, const std::function<bool()>& condition)
 {
     const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
     while (!condition()) {
-        if (std::chrono::steady_clock::now() > end)
+        if (!isRunning() || std::chrono::steady_clock::now() > end)
             throw std::runtime_error("it doesn't come about that " + what + "; the title is " + title());
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
     }
 }
 
-void DesktopUser::click(const std::string& sheet, const std::string& name)
+DesktopUser::Pixel DesktopUser::originOf(unsigned long window) const
 {
-    const auto place = m_places.at(sheet, name);
-    int left = 0;
-    int top = 0;
+    Pixel origin{0, 0};
     Window child = 0;
-    XTranslateCoordinates(m_display, m_container, DefaultRootWindow(m_display), 0, 0, &left, &top, &child);
-    m_user.moveTo(left + place.x + place.width / 2, top + place.y + place.height / 2);
+    XTranslateCoordinates(m_display, window, DefaultRootWindow(m_display), 0, 0, &origin.x, &origin.y, &child);
+    return origin;
+}
+
+DesktopUser::Pixel DesktopUser::middleOf(const WindowPlaces::Place& place) const
+{
+    const Pixel origin = originOf(m_container);
+    return {origin.x + place.x + place.width / 2, origin.y + place.y + place.height / 2};
+}
+
+void DesktopUser::clickAt(const WindowPlaces::Place& place)
+{
+    const Pixel middle = middleOf(place);
+    m_user.moveTo(middle.x, middle.y);
     m_user.click();
+}
+
+void DesktopUser::click(const std::string& sheet, const std::string& name, const std::string& text)
+{
+    clickAt(m_places.at(sheet, name, text));
+}
+
+void DesktopUser::clickChangeEvent(int row)
+{
+    const WindowPlaces::Place first = m_places.at(Main, "Change Table List Box Row");
+    clickAt(first.movedBy(0, row * first.height));
+}
+
+void DesktopUser::clickSecondVideo(const char* column)
+{
+    waitForRest(10);
+    const WindowPlaces::Place row = m_places.at(Videos, "VideosTable Row");
+    const WindowPlaces::Place title = m_places.at(Videos, "VideosTable Column", column);
+    clickAt({title.x, row.y + row.height, title.width, row.height});
+}
+
+void DesktopUser::chooseInMenu(int menu, int entry)
+{
+    const int windows = m_windows.windowCount();
+    press(XK_F10);
+    waitFor("the menus are open", [&] { return m_windows.windowCount() > windows; });
+    std::vector<unsigned long> keys(static_cast<std::size_t>(menu), XK_Right);
+    keys.insert(keys.end(), static_cast<std::size_t>(entry) + 1, XK_Down);
+    keys.push_back(XK_Return);
+    for (const unsigned long key : keys) {
+        // A menu takes no key before it is open.
+        waitForRest(10);
+        press(key);
+    }
+    waitFor("the menus are closed", [&] { return m_windows.windowCount() == windows; });
+}
+
+void DesktopUser::dropOn(const std::string& sheet, const std::string& name, const std::filesystem::path& file)
+{
+    constexpr int RestTurns = 20;
+    const Pixel middle = middleOf(m_places.at(sheet, name));
+    waitForRest(RestTurns);
+    const auto before = m_windows.pixelsOf(m_window);
+    cadrel::tests::dragFilesTo(m_window, {file}, middle.x, middle.y);
+    // The program hands it on to Cadrel's window, which opens a sheet.
+    waitFor("Cadrel takes the file", [&] { return m_windows.pixelsOf(m_window) != before; });
+    waitForRest(RestTurns);
+}
+
+void DesktopUser::dropOnTracks(const std::filesystem::path& file)
+{
+    const Pixel origin = originOf(m_window);
+    cadrel::tests::dragFilesTo(m_window, {file}, origin.x + Width / 2,
+                               origin.y + ShellLayout::of(Height, -1).tracksTop + TracksHeight / 2);
+}
+
+void DesktopUser::waitForStills(int oldNumber, int newNumber)
+{
+    const Pixel origin = originOf(m_container);
+    const cadrel::tests::MainStills stills(m_windows, {Width, ModuleHeight}, origin.x, origin.y);
+    waitFor("the stills show " + std::to_string(oldNumber) + " and " + std::to_string(newNumber),
+            [&] { return stills.oldNumber() == oldNumber && stills.newNumber() == newNumber; });
 }
 
 void DesktopUser::closeWindow()
@@ -165,18 +242,22 @@ void DesktopUser::closeWindow()
     XSync(m_display, False);
 }
 
-void DesktopUser::picture(const std::string& name)
+void DesktopUser::waitForRest(int turns)
 {
-    // Longer than from a change to its being drawn.
-    constexpr int StillTurns = 40;
     std::vector<char> shown;
     int still = 0;
     waitFor("the window comes to rest", [&] {
         auto now = m_windows.pixelsOf(m_window);
         still = now == shown ? still + 1 : 0;
         shown = std::move(now);
-        return still > StillTurns;
+        return still > turns;
     });
+}
+
+void DesktopUser::picture(const std::string& name)
+{
+    // Longer than from a change to its being drawn.
+    waitForRest(40);
     const std::filesystem::path folder =
         std::filesystem::path(cadrel::tests::programPath("../window")).lexically_normal();
     std::filesystem::create_directories(folder);
@@ -215,6 +296,11 @@ bool DesktopUser::isRunning()
     if (!m_hasEnded && waitpid(m_process, &m_status, WNOHANG) == m_process)
         m_hasEnded = true;
     return !m_hasEnded;
+}
+
+void DesktopUser::killProgram() const
+{
+    kill(m_process, SIGKILL);
 }
 
 int DesktopUser::status()

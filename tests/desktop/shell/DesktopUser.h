@@ -19,11 +19,12 @@ namespace desktop::tests {
 
 /// The desktop program in a process of its own, and a user in front of it with mouse and keyboard. The window gets a size in which
 /// Cadrel's has its smallest one, so that its controls stand where WindowPlaces says. Everything that doesn't come about within
-/// ten seconds throws std::runtime_error.
+/// ten seconds, or before the program ends, throws std::runtime_error.
 class DesktopUser {
 public:
     static constexpr const char* Main = "";
     static constexpr const char* Files = "m_fileDialog";
+    static constexpr const char* Videos = "m_videosDialog";
 
     /// Starts the program on the screen of the environment, with its state in the folder `home`, and waits for its window and
     /// for Cadrel's. `answer` is the key that a question before that is answered with, or 0.
@@ -33,8 +34,17 @@ public:
     /// Kills the program if it still runs.
     ~DesktopUser();
 
-    /// In the middle of a control of Cadrel's.
-    void click(const std::string& sheet, const std::string& name);
+    /// In the middle of a control of Cadrel's, named as in WindowPlaces.
+    void click(const std::string& sheet, const std::string& name, const std::string& text = "");
+    /// On an event of the change list, counted from 0.
+    void clickChangeEvent(int row);
+    /// In the second row of the videos, below the title of a column.
+    void clickSecondVideo(const char* column);
+    /// Chooses an entry of a menu by the keyboard: both are counted from 0, the entries without the lines between them.
+    void chooseInMenu(int menu, int entry);
+    /// Drags a file from another program to the middle of a control of Cadrel's, or of the tracks, and lets it go there.
+    void dropOn(const std::string& sheet, const std::string& name, const std::filesystem::path& file);
+    void dropOnTracks(const std::filesystem::path& file);
     void press(unsigned long key, unsigned long held = 0, unsigned long heldToo = 0)
     {
         m_user.press(key, held, heldToo);
@@ -46,19 +56,34 @@ public:
     /// Writes what the window shows to the folder `window` of the build, when it has come to rest. Without a window manager.
     void picture(const std::string& name);
 
+    /// Waits until Cadrel's window shows both stills with these numbers in their bars.
+    void waitForStills(int oldNumber, int newNumber);
+
+    /// Until what the window shows has stayed the same for so many turns of ten milliseconds or more.
+    void waitForRest(int turns);
     std::string title() const;
     bool isBoxOpen() const;
     void waitForBox(bool isOpen);
     void waitForTitle(const std::string& what, const std::function<bool(const std::string&)>& fits);
     /// Saves by the keyboard, and waits until there is no mark of unsaved work.
     void save();
+    /// At once, from any thread.
+    void killProgram() const;
     /// Waits for the end of the program and answers its exit status.
     int status();
     bool isRunning();
 
 private:
     unsigned long findWindow(unsigned long within) const;
-    void waitFor(const std::string& what, const std::function<bool()>& condition) const;
+    void waitFor(const std::string& what, const std::function<bool()>& condition);
+    /// Of the screen.
+    struct Pixel {
+        int x;
+        int y;
+    };
+    Pixel originOf(unsigned long window) const;
+    Pixel middleOf(const cadrel::tests::WindowPlaces::Place& place) const;
+    void clickAt(const cadrel::tests::WindowPlaces::Place& place);
 
     _XDisplay* m_display;
     pid_t m_process;

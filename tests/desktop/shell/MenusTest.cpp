@@ -79,14 +79,15 @@ TEST(Menus, ListAllEntriesAfterTheStateBeforeThemAndTickThePresentOne)
     }
 }
 
-TEST(Menus, ListTheEntriesAroundThePresentOneWhereThereAreMany)
+TEST(Menus, ListAllEntriesWhereThereAreMoreThanFitOnAScreen)
 {
     MenuState state = edited();
     state.undoNames.assign(100, u"Edit");
     for (const std::size_t position : {std::size_t{0}, std::size_t{20}, std::size_t{50}, std::size_t{100}}) {
         state.undoPosition = position;
         const auto history = itemNamed(menusOf(state)[1].items, "History").items;
-        EXPECT_EQ(history.size(), 41U);
+        EXPECT_EQ(history.size(), 101U);
+        EXPECT_EQ(history.back().command, MenuCommand::FirstHistory + 100);
         EXPECT_EQ(std::count_if(history.begin(), history.end(), [](const MenuItem& item) { return item.isTicked; }), 1)
             << position;
     }

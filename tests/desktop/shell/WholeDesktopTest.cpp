@@ -1,7 +1,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
+#include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/model/DataModel.h"
+#include "core/settings/Settings.h"
+#include "core/time/Framerate.h"
+#include "core/time/Timecode.h"
+#include "desktop/document/Autosave.h"
 #include "standin/Application.h"
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
@@ -11,17 +16,23 @@
 #include "tests/support/TreePaths.h"
 #include "tests/support/core/TestProject.h"
 #include "tests/support/standin/TestHost.h"
+#include "tests/support/video/TestVideos.h"
 #include "tests/support/x11/VirtualScreen.h"
+#include "util/StringUtil.h"
 
 #include <gtest/gtest.h>
 
 #include <X11/keysym.h>
 
 #include <chrono>
+#include <cmath>
 #include <csignal>
+#include <cstdlib>
 #include <filesystem>
+#include <iostream>
 #include <memory>
 #include <optional>
+#include <random>
 #include <stdexcept>
 #include <string>
 #include <thread>
@@ -39,6 +50,27 @@ namespace fs = std::filesystem;
 fs::path exampleFile(const char* name)
 {
     return fs::path(cadrel::tests::treePath("examples/reel3")) / name;
+}
+
+/// 03:01:06:05 in the old cut and 03:01:04:21 in the new one; the project begins at 03:00:00:00.
+constexpr const char16_t* Clip = u"42A-3 Maren";
+constexpr double OldStart = 66.0 + 5.0 / 24.0;
+constexpr double NewStart = 64.0 + 21.0 / 24.0;
+/// Its copy in the preview.
+constexpr double PreviewStart = 24.0 * 60.0 * 60.0 + NewStart;
+constexpr double SameInstant = 1.0 / 384000;
+
+/// The four of each event, in the order of the list.
+std::vector<std::string> timecodesOf(const core::EventList& list)
+{
+    std::vector<std::string> texts;
+    for (const auto& event : list.events()) {
+        std::string text;
+        for (const core::Timecode& each : {event->srcIn(), event->srcOut(), event->dstIn(), event->dstOut()})
+            text.append(text.empty() ? "" : " ").append(each.toString());
+        texts.push_back(text);
+    }
+    return texts;
 }
 
 /// A window manager, which frames the windows and gives them the keyboard.
@@ -75,11 +107,12 @@ protected:
             m_manager.emplace();
         for (const char* const name : {"reel3.stage", "reel3_v07.edl", "reel3_v12.edl"})
             fs::copy_file(exampleFile(name), m_folder / name);
-        // Where they have been rendered, its videos are seen.
-        if (fs::exists(exampleFile("Video")))
-            fs::create_directory_symlink(exampleFile("Video"), m_folder / "Video");
+        fs::create_directory(m_folder / "Video");
+        for (const char* const cut : {"v07", "v12"})
+            fs::create_symlink(standin::tests::reel3VideoOf(cut), videoFile(cut));
     }
 
+    fs::path videoFile(const std::string& cut) const { return m_folder / ("Video/LW_R3_" + cut + ".mov"); }
     /// For the manual, in which nothing has a frame of a window manager's.
     void picture(const std::string& name)
     {
@@ -104,6 +137,42 @@ protected:
         addCut("Load New Edl Button", "reel3_v12.edl");
         m_user->save();
     }
+    /// The project has the video of the old cut alone.
+    void addNewVideo()
+    {
+        constexpr int ProjectMenu = 3;
+        constexpr int AddVideo = 1;
+        m_user->chooseInMenu(ProjectMenu, AddVideo);
+        m_user->waitForBox(true);
+        m_user->type(videoFile("v12").string());
+        m_user->press(XK_Return);
+        m_user->waitForBox(false);
+        m_user->save();
+        m_user->click(DesktopUser::Main, "m_showNewVideosDialogButton");
+        m_user->clickSecondVideo("Use as New Video");
+        // Beside the sheet, which closes it.
+        m_user->click(DesktopUser::Main, "videodisplay");
+        m_user->save();
+    }
+    void switchPreview()
+    {
+        m_user->click(DesktopUser::Main, "new component", "Preview");
+        m_user->save();
+    }
+    /// The change events that the two cuts give with the usual settings.
+    std::vector<std::string> generatedEvents()
+    {
+        core::DataModel model;
+        const auto load = [&](core::EventList& list, const char* file) {
+            core::Framerate shown;
+            list.load(cadrel::util::StringUtil::toWide(exampleFile(file).string()), false, shown,
+                      model.settings().bRollRenaming(), false);
+        };
+        load(model.oldEdl(), "reel3_v07.edl");
+        load(model.newEdl(), "reel3_v12.edl");
+        model.generateChangeEdl();
+        return timecodesOf(model.changeEdl());
+    }
     std::unique_ptr<core::DataModel> storedModel()
     {
         auto model = std::make_unique<core::DataModel>();
@@ -111,8 +180,8 @@ protected:
         archive >> *model;
         return model;
     }
-    /// Where the clip begins on the first dialogue track of the file, in seconds of the project.
-    double storedStartOf(const std::u16string& clip)
+    /// Whether a take of the clip begins there on the first dialogue track of the file, in seconds of the project.
+    bool hasClipAt(double start)
     {
         standin::Application host;
         standin::Project& project = host.openProject(m_file);
@@ -120,11 +189,85 @@ protected:
             if (std::u16string_view(track->getName()) != u"DIA 1")
                 continue;
             for (const auto& each : standin::tests::childrenOf(*track)) {
-                if (clip == each->getName())
-                    return each->getStart(nullptr);
+                if (std::u16string_view(each->getName()) == Clip &&
+                    std::abs(each->getStart(nullptr) - start) < SameInstant)
+                    return true;
             }
         }
-        throw std::runtime_error("there is no such clip");
+        return false;
+    }
+    bool isConformed() { return hasClipAt(NewStart) && !hasClipAt(OldStart); }
+    bool isAsBefore() { return hasClipAt(OldStart) && !hasClipAt(NewStart); }
+
+    /// The lists of a content of the file, and how many tracks it has. Throws where it isn't whole.
+    std::vector<std::string> stateOf(const std::string& content)
+    {
+        standin::Application host;
+        standin::Project& project = host.openProject(m_file, content);
+        std::vector<std::string> state{std::to_string(project.allTracks().size())};
+        const auto stored = cadrel::tests::StoredModel::in(project);
+        if (!stored)
+            return state;
+        core::DataModel model;
+        auto archive = cadrel::tests::archiveOf(stored->block);
+        archive >> model;
+        for (const core::EventList* const list : {&model.oldEdl(), &model.newEdl(), &model.changeEdl()}) {
+            state.push_back(std::to_string(list->size()));
+            for (const std::string& timecodes : timecodesOf(*list))
+                state.push_back(timecodes);
+        }
+        return state;
+    }
+    /// Adds both cuts and generates; then undoes and redoes that, and saves every now and then.
+    void workUntilKilled()
+    {
+        // After which the program keeps unsaved work.
+        constexpr std::chrono::milliseconds Thought(600);
+        try {
+            addCut("Load Old Edl Button", "reel3_v07.edl");
+            addCut("Load New Edl Button", "reel3_v12.edl");
+            m_user->click(DesktopUser::Main, "Generate Button");
+            for (;;) {
+                for (const bool isRedone : {false, true, false}) {
+                    m_user->press('z', XK_Control_L, isRedone ? XK_Shift_L : 0);
+                    std::this_thread::sleep_for(Thought);
+                }
+                m_user->save();
+                m_user->press('z', XK_Control_L, XK_Shift_L);
+                m_user->save();
+            }
+        } catch (const std::runtime_error&) {
+        }
+    }
+    void killAt(std::chrono::milliseconds moment)
+    {
+        fs::copy_file(exampleFile("reel3.stage"), m_file, fs::copy_options::overwrite_existing);
+        start();
+        std::thread killer([&] {
+            std::this_thread::sleep_for(moment);
+            m_user->killProgram();
+        });
+        workUntilKilled();
+        killer.join();
+        EXPECT_EQ(m_user->status(), -1) << "It has ended by the signal.";
+    }
+    /// Opens the project after the program was killed; returns whether unsaved work was offered and recovered.
+    bool recover()
+    {
+        const std::string stored = cadrel::tests::contentOf(m_file);
+        EXPECT_EQ(stateOf(stored).front(), stateOf(cadrel::tests::contentOf(exampleFile("reel3.stage"))).front());
+        const auto kept = Autosave::read(m_file);
+        EXPECT_EQ(fs::exists(Autosave::pathFor(m_file)), kept.has_value());
+        const bool isOffered = kept && kept->content != stored;
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, isOffered ? XK_Return : 0);
+        if (isOffered) {
+            m_user->save();
+            EXPECT_EQ(stateOf(cadrel::tests::contentOf(m_file)), stateOf(kept->content));
+        }
+        EXPECT_FALSE(fs::exists(Autosave::pathFor(m_file)));
+        m_user->press('q', XK_Control_L);
+        EXPECT_EQ(m_user->status(), 0);
+        return isOffered;
     }
 
     cadrel::tests::VirtualScreen m_screen{1400, 1250};
@@ -135,12 +278,6 @@ protected:
     std::optional<DesktopUser> m_user;
 };
 
-/// 03:01:06:05 in the old cut and 03:01:04:21 in the new one; the project begins at 03:00:00:00.
-constexpr const char16_t* Clip = u"42A-3 Maren";
-constexpr double OldStart = 66.0 + 5.0 / 24.0;
-constexpr double NewStart = 64.0 + 21.0 / 24.0;
-constexpr double SameInstant = 1.0 / 384000;
-
 TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
 {
     start();
@@ -148,17 +285,30 @@ TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
     addCuts();
     m_user->click(DesktopUser::Main, "Generate Button");
     m_user->save();
-    m_user->click(DesktopUser::Main, "Change Table List Box Row");
-    m_user->press(XK_Down);
-    m_user->press(XK_Down);
+    m_user->clickChangeEvent(2);
     picture("desktop-generated");
     m_user->save(); // with what is selected
     const auto generated = storedModel();
     EXPECT_EQ(generated->oldEdl().size(), 152U);
     EXPECT_EQ(generated->newEdl().size(), 153U);
+    const std::vector<std::string> changes = timecodesOf(generated->changeEdl());
+    EXPECT_EQ(changes, generatedEvents());
     // As many as `cadrel generate` tells.
-    EXPECT_EQ(generated->changeEdl().size(), 60U);
-    EXPECT_NEAR(storedStartOf(Clip), OldStart, SameInstant);
+    ASSERT_EQ(changes.size(), 60U);
+    // After a dissolve to a B-roll, which is found by the name of its roll.
+    EXPECT_EQ(changes[46], "03:12:14:17 03:12:33:21 03:11:23:09 03:11:42:13");
+    EXPECT_TRUE(isAsBefore());
+
+    addNewVideo();
+    // The selected event is 03:00:33:03 03:01:13:23 03:00:31:19 03:01:12:15.
+    m_user->waitForStills(33 * 24 + 3, 31 * 24 + 19);
+    switchPreview();
+    EXPECT_TRUE(storedModel()->isPreviewActive());
+    EXPECT_TRUE(hasClipAt(PreviewStart));
+    EXPECT_TRUE(isAsBefore());
+    switchPreview();
+    EXPECT_FALSE(storedModel()->isPreviewActive());
+    EXPECT_FALSE(hasClipAt(PreviewStart));
 
     m_user->click(DesktopUser::Main, "Cadrel Button");
     m_user->waitForBox(true);
@@ -166,17 +316,17 @@ TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
     m_user->press(XK_Return); // Keep
     m_user->waitForBox(false);
     m_user->save();
-    EXPECT_NEAR(storedStartOf(Clip), NewStart, SameInstant);
+    EXPECT_TRUE(isConformed());
     m_user->press('g');
     picture("desktop-conformed");
     m_user->press('g');
 
     m_user->press('z', XK_Control_L);
     m_user->save();
-    EXPECT_NEAR(storedStartOf(Clip), OldStart, SameInstant);
+    EXPECT_TRUE(isAsBefore());
     m_user->press('z', XK_Control_L, XK_Shift_L);
     m_user->save();
-    EXPECT_NEAR(storedStartOf(Clip), NewStart, SameInstant);
+    EXPECT_TRUE(isConformed());
     m_user->press('q', XK_Control_L);
     EXPECT_EQ(m_user->status(), 0);
 
@@ -184,7 +334,22 @@ TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
     m_user->waitForTitle("nothing is unsaved", [](const std::string& text) { return text == "reel3.stage - Cadrel"; });
     m_user->closeWindow();
     EXPECT_EQ(m_user->status(), 0) << "Nothing was changed, so that nothing is asked.";
-    EXPECT_NEAR(storedStartOf(Clip), NewStart, SameInstant);
+    EXPECT_TRUE(isConformed());
+}
+
+TEST_P(WholeDesktopTest, TakesADroppedEdlIntoTheTableOverWhichItWasLetGo)
+{
+    start();
+    m_user->dropOnTracks(m_folder / "reel3_v07.edl");
+    m_user->waitForBox(true); // It tells where EDLs belong.
+    m_user->press(XK_Return);
+    m_user->waitForBox(false);
+
+    m_user->dropOn(DesktopUser::Main, "New Table List Box", m_folder / "reel3_v12.edl");
+    m_user->click(DesktopUser::Files, "Ok Button");
+    m_user->save();
+    EXPECT_EQ(storedModel()->newEdl().size(), 153U);
+    EXPECT_TRUE(storedModel()->oldEdl().isEmpty());
 }
 
 TEST_P(WholeDesktopTest, AsksBeforeUnsavedWorkIsLost)
@@ -224,6 +389,28 @@ TEST_P(WholeDesktopTest, OffersUnsavedWorkAfterItWasKilled)
     m_user->save();
     EXPECT_EQ(storedModel()->oldEdl().size(), 152U);
     EXPECT_FALSE(fs::exists(kept));
+}
+
+// A few times; the variable CADREL_KILLS says how often else.
+TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyMoment)
+{
+    constexpr int Longest = 5000;
+    const char* const wanted = std::getenv("CADREL_KILLS");
+    const int count = wanted ? std::atoi(wanted) : 2;
+    std::mt19937 random(GetParam() ? 2 : 1);
+    int offered = 0;
+    for (int trial = 0; trial < count; ++trial) {
+        const auto moment = std::chrono::milliseconds(random() % Longest);
+        SCOPED_TRACE(testing::Message() << "killed after " << moment.count() << " ms");
+        killAt(moment);
+        offered += recover() ? 1 : 0;
+        if (HasFailure())
+            return;
+    }
+    std::cout << "unsaved work was offered " << offered << " times of " << count << '\n';
+    if (count >= 20) {
+        EXPECT_GE(offered, count / 5);
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(WithoutAndWithAWindowManager, WholeDesktopTest, testing::Bool(),

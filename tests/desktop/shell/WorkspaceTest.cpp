@@ -8,13 +8,17 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <filesystem>
+#include <stdexcept>
 #include <string>
 
 namespace desktop::tests {
 namespace {
 
 namespace fs = std::filesystem;
+
+using standin::tests::FakeBoxes;
 
 /// A user at the desk, who answers boxes as he has decided beforehand.
 class WorkspaceTest : public testing::Test, protected DocumentHost {
@@ -33,7 +37,7 @@ protected:
     /// What he was told or asked last.
     std::string lastMessage() const { return boxes.messages.empty() ? "" : standin::toUtf8(boxes.messages.back()); }
 
-    standin::tests::FakeBoxes boxes;
+    FakeBoxes boxes;
     Workspace workspace{documents, boxes};
 };
 
@@ -155,14 +159,79 @@ TEST_F(WorkspaceTest, TellsOnceThatTheFileWasChangedByAnotherProgram)
     EXPECT_EQ(documents.active()->project().allTracks().size(), 1U);
 }
 
-TEST_F(WorkspaceTest, LoadsAChangedFileAnewWhereTheUserWantsThat)
+TEST_F(WorkspaceTest, ReloadsAChangedFileWhereTheUserWantsThat)
 {
     opened();
     folder.write("reel.stage", contentOf(writeProject("foreign.stage", 3)));
-    boxes.answers = {u"Load It Anew"};
+    boxes.answers = {u"Reload"};
     workspace.lookAtFile();
     EXPECT_EQ(documents.size(), 1U);
     EXPECT_EQ(documents.active()->project().allTracks().size(), 3U);
+}
+
+// Whoever presses a key just when a box comes up.
+
+TEST_F(WorkspaceTest, KeepsUnsavedWorkOfAChangedFileWhenReturnOrEscapeIsPressed)
+{
+    for (const char16_t* const key : {FakeBoxes::Return, FakeBoxes::Escape}) {
+        OpenDocument& document = opened(key == FakeBoxes::Return ? "a.stage" : "b.stage");
+        renameTrack(document, u"Edited");
+        writeProject(document.name(), 3);
+        boxes.answers = {key};
+        workspace.lookAtFile();
+        EXPECT_TRUE(boxes.answers.empty()) << "It was asked.";
+        ASSERT_EQ(documents.active(), &document);
+        EXPECT_EQ(trackOf(document).name(), u"Edited");
+        EXPECT_TRUE(document.isUnsaved());
+    }
+}
+
+TEST_F(WorkspaceTest, OverwritesNothingOfAnotherProgramWhenReturnOrEscapeIsPressed)
+{
+    OpenDocument& document = edited();
+    const std::string foreign = contentOf(writeProject("foreign.stage", 3));
+    folder.write("reel.stage", foreign);
+    for (const char16_t* const key : {FakeBoxes::Return, FakeBoxes::Escape}) {
+        boxes.answers = {key};
+        EXPECT_FALSE(workspace.save(document));
+        EXPECT_EQ(contentOf(folder / "reel.stage"), foreign);
+    }
+    EXPECT_TRUE(document.isUnsaved());
+}
+
+TEST_F(WorkspaceTest, OpensNothingThatIsOpenElsewhereWhenReturnOrEscapeIsPressed)
+{
+    const fs::path file = fs::canonical(writeProject("reel.stage"));
+    const DocumentLock lock(file);
+    for (const char16_t* const key : {FakeBoxes::Return, FakeBoxes::Escape}) {
+        boxes.answers = {key};
+        EXPECT_FALSE(workspace.open(file));
+    }
+    EXPECT_EQ(documents.size(), 0U);
+    boxes.answers = {u"Open All the Same"};
+    EXPECT_TRUE(workspace.open(file));
+}
+
+TEST_F(WorkspaceTest, LosesNothingWhenReturnOrEscapeIsPressedBeforeClosing)
+{
+    boxes.answers = {FakeBoxes::Escape};
+    EXPECT_FALSE(workspace.close(edited()));
+    boxes.answers = {FakeBoxes::Return};
+    EXPECT_TRUE(workspace.close(*documents.active()));
+    EXPECT_NE(contentOf(folder / "reel.stage").find("Edited"), std::string::npos) << "It was saved.";
+}
+
+TEST_F(WorkspaceTest, KeepsTheWorkOfAProgramThatHasEndedWhenReturnOrEscapeIsPressed)
+{
+    const fs::path file = fs::canonical(writeProject("crashed.stage"));
+    Autosave::write(file, ContentPrint::of(contentOf(file)), contentOf(writeProject("unsaved.stage", 2)),
+                    Autosave::Time::clock::now());
+    boxes.answers = {FakeBoxes::Escape};
+    EXPECT_FALSE(workspace.open(file));
+    EXPECT_TRUE(fs::exists(Autosave::pathFor(file)));
+    boxes.answers = {FakeBoxes::Return};
+    EXPECT_TRUE(workspace.open(file));
+    EXPECT_EQ(documents.active()->project().allTracks().size(), 2U);
 }
 
 TEST_F(WorkspaceTest, OffersTheWorkOfAProgramThatHasEndedWithoutSaving)
@@ -188,6 +257,93 @@ TEST_F(WorkspaceTest, OpensNothingWhereTheUserCancelsTheOffer)
     EXPECT_FALSE(workspace.open(file));
     EXPECT_EQ(documents.size(), 0U);
     EXPECT_TRUE(fs::exists(Autosave::pathFor(fs::canonical(file)))) << "It is offered again the next time.";
+}
+
+TEST_F(WorkspaceTest, ClosesNoOtherTabWhenOneIsClosedTwice)
+{
+    const std::uint64_t first = opened("a.stage").id();
+    const std::uint64_t second = opened("b.stage").id();
+    workspace.closeTab(first);
+    workspace.closeTab(first);
+    workspace.activateTab(first);
+    ASSERT_EQ(documents.size(), 1U);
+    EXPECT_EQ(documents.active()->name(), "b.stage");
+    workspace.closeTab(second);
+    workspace.closeTab(second);
+    EXPECT_EQ(documents.size(), 0U);
+}
+
+TEST_F(WorkspaceTest, GivesATabThatIsOpenedLaterAnotherIdAndAReloadedOneTheSame)
+{
+    const std::uint64_t first = opened("a.stage").id();
+    workspace.closeTab(first);
+    OpenDocument& document = opened("a.stage");
+    EXPECT_NE(document.id(), first);
+    const std::uint64_t id = document.id();
+    EXPECT_EQ(documents.reload(document).id(), id);
+    EXPECT_EQ(documents.withId(id), documents.active());
+    EXPECT_THROW(documents.at(1), std::out_of_range);
+}
+
+TEST_F(WorkspaceTest, KeepsTheMediaOfAProjectThatIsSavedInAnotherFolder)
+{
+    const auto project = [](const char* path) {
+        return std::string(R"({"format": "stage", "version": 1, "framesPerSecond": 24, "tracks": [], "pool": [)"
+                           R"({"number": 1, "kind": "audio", "name": "a", "path": ")")
+            .append(path)
+            .append(R"(", "length": 2}]})");
+    };
+    const fs::path top = fs::canonical(folder / "");
+    fs::create_directories(top / "film/Audio");
+    fs::create_directories(top / "out");
+    folder.write("film/Audio/beside.wav", "");
+    struct Case {
+        const char* path;
+        const char* target;
+        std::string stored;
+    };
+    // Without the trailing slash that canonical leaves where the folder had one.
+    const std::string film = (top / "film").string();
+    for (const Case& each :
+         {Case{"Audio/a.wav", "out/x.stage", film + "/Audio/a.wav"},
+          Case{"../lib/a.wav", "out/x.stage", (top / "lib/a.wav").string()},
+          Case{"Audio/a.wav", "x.stage", "film/Audio/a.wav"}, Case{"Audio/a.wav", "film/Audio/x.stage", "a.wav"},
+          Case{"Audio/a.wav", "film/x.stage", "Audio/a.wav"}, Case{"/fx/a.wav", "out/x.stage", "/fx/a.wav"},
+          Case{"C:\\\\fx\\\\a.wav", "out/x.stage", "C:\\fx\\a.wav"}, Case{"", "out/x.stage", ""}}) {
+        folder.write("film/reel.stage", project(each.path));
+        ASSERT_TRUE(workspace.open(folder / "film/reel.stage")) << lastMessage();
+        OpenDocument& document = *documents.active();
+        const auto pathNow = [&] { return standin::toUtf8(document.project().pool().clipWith(1)->path()); };
+        const std::string before = pathNow();
+        boxes.choices = {{standin::toUtf16((top / "missing/x.stage").string())}};
+        EXPECT_FALSE(workspace.saveAs(document));
+        EXPECT_EQ(pathNow(), before) << "Nothing was stored.";
+
+        boxes.choices = {{standin::toUtf16((top / each.target).string())}};
+        ASSERT_TRUE(workspace.saveAs(document)) << lastMessage();
+        EXPECT_EQ(pathNow(), each.stored);
+        EXPECT_FALSE(document.settleUnsaved());
+        documents.close(document);
+        ASSERT_TRUE(workspace.open(top / each.target));
+        EXPECT_EQ(standin::toUtf8(documents.active()->project().pool().clipWith(1)->path()), each.stored);
+        documents.close(*documents.active());
+        fs::remove(top / each.target);
+    }
+}
+
+TEST_F(WorkspaceTest, TellsOnceThatUnsavedWorkHasNoAutosave)
+{
+    folder.write("reel.stage.autosave", "my notes");
+    OpenDocument& document = opened();
+    workspace.lookAtAutosaves();
+    EXPECT_EQ(lastMessage(), "") << "There is nothing to be lost yet.";
+    for (const char16_t* const name : {u"A", u"B"}) {
+        renameTrack(document, name);
+        idle();
+        workspace.lookAtAutosaves();
+        EXPECT_EQ(boxes.messages.size(), 1U);
+        EXPECT_NE(lastMessage().find("reel.stage.autosave: is in the way"), std::string::npos) << lastMessage();
+    }
 }
 
 TEST_F(WorkspaceTest, SaysThatAFileIsNoVideo)

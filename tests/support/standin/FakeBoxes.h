@@ -15,7 +15,13 @@ namespace standin::tests {
 /// A user who has decided beforehand what he answers.
 class FakeBoxes : public UserBoxes {
 public:
-    /// Labels of the buttons that he uses in the next alerts; the first one of an alert for which there is none left.
+    using UserBoxes::ask;
+
+    /// For a key that he presses instead.
+    static constexpr const char16_t* Return = u"\r";
+    static constexpr const char16_t* Escape = u"\x1B";
+
+    /// Labels of the buttons that he uses in the next alerts; Return in an alert for which there is none left.
     std::deque<std::u16string> answers;
     /// What he takes in the next file boxes; nothing when there is none left.
     std::deque<std::vector<std::u16string>> choices;
@@ -26,15 +32,20 @@ public:
     std::vector<Progress> shown;
     int ended = 0;
 
-    std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons) override
+    std::size_t ask(const std::u16string& message, const std::vector<std::u16string>& buttons,
+                    std::size_t byReturn) override
     {
         messages.push_back(message);
-        if (answers.empty())
-            return 0;
-        const auto found = std::find(buttons.begin(), buttons.end(), answers.front());
+        const std::u16string answer = answers.empty() ? Return : answers.front();
+        if (!answers.empty())
+            answers.pop_front();
+        if (answer == Return)
+            return byReturn;
+        if (answer == Escape)
+            return buttons.size() - 1;
+        const auto found = std::find(buttons.begin(), buttons.end(), answer);
         if (found == buttons.end())
             throw std::logic_error("the alert has no such button");
-        answers.pop_front();
         return static_cast<std::size_t>(found - buttons.begin());
     }
     std::vector<std::u16string> chooseFiles(const FileQuestion& question) override
