@@ -15,6 +15,7 @@
 #include <CLI/CLI.hpp>
 #include <algorithm>
 #include <array>
+#include <cmath>
 #include <cstdint>
 #include <functional>
 #include <iterator>
@@ -389,7 +390,13 @@ CLI::App* addApply(CLI::App& program, ApplyOptions& options)
     apply->add_flag("--in-place", options.inPlace, "Replace the project itself")->excludes("--output");
     apply->add_option("--fade", options.fade, "How long clips of a session fade where they were cut (64 samples)")
         ->type_name("MS")
-        ->check(CLI::Range(0.0, 10000.0));
+        ->check(CLI::Range(0.0, 10000.0))
+        ->check([](const std::string& word) {
+            // What is no number lies neither below a range nor above it.
+            double number = 0.0;
+            const bool isNumber = CLI::detail::lexical_cast(word, number) && !std::isnan(number);
+            return isNumber ? std::string() : app::quoted(word) + " is no number";
+        });
     addOutput(*apply, "--json", options.jsonFile, AllJsonHelp);
     CLI::Option* const notes = addOutput(*apply, "--notes", options.notesFile,
                                          "Also write change notes with what happened to the sound: .html, .pdf, .csv, "

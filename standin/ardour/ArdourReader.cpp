@@ -5,6 +5,7 @@
 #include "standin/ardour/ListText.h"
 #include "standin/ardour/OwnStorage.h"
 #include "standin/ardour/RegionFades.h"
+#include "standin/ardour/RegionPiece.h"
 #include "standin/base/Text.h"
 #include "standin/base/Times.h"
 #include "standin/base/Utf16.h"
@@ -344,6 +345,10 @@ void ArdourReader::readRoutes(Project& project)
         if (!m_playlists.emplace(idOf(playlist), playlist).second)
             throw FileFault("Playlists", "has two playlists with one id");
     }
+    for (Track* const track : project.allTracks()) {
+        if (track->kind() == Track::Kind::Audio)
+            m_tracks.emplace(attributeId(*track, SessionKey::Route), Counted<Track>::share(track));
+    }
     for (const pugi::xml_node& route : m_root.child("Routes").children("Route"))
         readRoute(route, project);
     for (const pugi::xml_node& vca : m_root.child("VCAManager").children("VCA"))
@@ -364,7 +369,7 @@ void ArdourReader::readRoute(const pugi::xml_node& route, Project& project)
         m_session.staying.push_back("the MIDI track " + quoted(std::string_view(name)));
         return;
     }
-    const Counted<Track> track = trackOf(id, project);
+    const Counted<Track> track = trackOf(id);
     track->setName(textOf(name));
     readLists(id, route, *track);
 
@@ -392,25 +397,23 @@ void ArdourReader::readVca(const pugi::xml_node& vca, Project& project)
     if (!number || *number == 0)
         throw FileFault("VCAManager", "has a VCA without a number");
     const SessionId key = vcaKey(*number);
-    const Counted<Track> track = trackOf(key, project);
+    const Counted<Track> track = trackOf(key);
     track->setName(textOf(vca.attribute("name").value()));
     readLists(key, vca, *track);
     if (hasPoints(*track))
         track->insertInto(project);
 }
 
-Counted<Track> ArdourReader::trackOf(SessionId route, Project& project)
+Counted<Track> ArdourReader::trackOf(SessionId route)
 {
     // What Cadrel has stored of a track comes first.
-    for (Track* const candidate : project.allTracks()) {
-        if (candidate->kind() == Track::Kind::Audio && attributeId(*candidate, SessionKey::Route) == route) {
-            auto stored = Counted<Track>::share(candidate);
-            stored->remove();
-            return stored;
-        }
+    Counted<Track>& track = m_tracks[route];
+    if (!track) {
+        track = Track::create(Track::Kind::Audio);
+        setId(*track, SessionKey::Route, route);
+    } else if (track->parent()) {
+        track->remove();
     }
-    const Counted<Track> track = Track::create(Track::Kind::Audio);
-    setId(*track, SessionKey::Route, route);
     return track;
 }
 
@@ -471,9 +474,28 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
     event->setClip(clip->second);
     event->setName(textOf(name));
     setId(*event, SessionKey::Region, id);
-    event->setSourceOffset(clock.secondsOf(read.start));
-    event->setSpan(clock.secondsOf(read.position), clock.secondsOf(read.position + read.length));
+    const double first = clock.secondsOf(read.position);
+    double head = first;
+    double tail = clock.secondsOf(read.position + read.length);
+    if (static_cast<double>(read.length) > 2.0 * NearToCut) {
+        head += std::max(distanceToFrame(head), 0.0);
+        tail += std::min(distanceToFrame(tail), 0.0);
+    }
+    event->setSourceOffset(clock.secondsOf(read.start) + (head - first));
+    event->setSpan(head, tail);
     event->insertInto(track);
+}
+
+double ArdourReader::distanceToFrame(double seconds) const
+{
+    const double frames = m_project->frameRate().framesPerSecond;
+    const auto samples = static_cast<double>(m_session.clock.sampleRate());
+    if (std::abs(samples / frames - std::round(samples / frames)) < 1e-6)
+        return 0.0;
+    const double origin = m_project->timeOrigin();
+    const double distance = std::round((seconds + origin) * frames) / frames - origin - seconds;
+    // Nearer by more than rounding, so that the region is whole when it is written.
+    return std::abs(distance) * samples < NearToCut - 1e-3 ? distance : 0.0;
 }
 
 void ArdourReader::readLists(SessionId route, const pugi::xml_node& node, Track& track)

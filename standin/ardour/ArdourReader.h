@@ -3,6 +3,7 @@
 #pragma once
 
 #include "standin/ardour/ArdourSession.h"
+#include "standin/project/Track.h"
 #include "velmark/Counted.h"
 
 #include <pugixml.hpp>
@@ -16,7 +17,6 @@ namespace standin {
 class ChangeLog;
 class MediaClip;
 class Project;
-class Track;
 
 /// Reads the text of a session. Nothing in it is trusted.
 class ArdourReader {
@@ -47,9 +47,12 @@ private:
     void readRoute(const pugi::xml_node& route, Project& project);
     void readVca(const pugi::xml_node& vca, Project& project);
     /// The track that was stored for a route, taken out of the project, or a new one.
-    Velmark::Counted<Track> trackOf(SessionId route, Project& project);
+    Velmark::Counted<Track> trackOf(SessionId route);
     void readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track);
     void readRegion(const pugi::xml_node& region, Track& track);
+    /// How far the frame lies from a time that is near to it, in seconds; 0 for a time that isn't, and where each frame is a
+    /// whole number of samples.
+    double distanceToFrame(double seconds) const;
     void readLists(SessionId route, const pugi::xml_node& node, Track& track);
     void readList(SessionId route, const pugi::xml_node& list, Track& track, int number);
     void dropGoneTracks(Project& project);
@@ -69,6 +72,8 @@ private:
     std::map<SessionId, Velmark::Counted<MediaClip>> m_clips; ///< by their sources
     std::map<SessionId, pugi::xml_node> m_playlists;
     std::set<SessionId> m_playlistsRead;
+    std::map<SessionId, Velmark::Counted<Track>>
+        m_tracks;                       ///< by their routes, those that Cadrel has stored and new ones
     std::vector<SessionId> m_order;     ///< of the locations
     std::set<SessionId> m_ownLocations; ///< which stand for markers on Cadrel's tracks
 };

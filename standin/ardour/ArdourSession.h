@@ -81,6 +81,7 @@ struct ArdourSession {
     std::string ownText;               ///< in it
     std::vector<SessionId> ownMarkers; ///< the locations of the markers in that text, in their order
     bool isOwnBroken = false;
+    bool isEndSet = false; ///< since it was read
     std::string ownAsRead; ///< what would be put there for the project as it was read
     /// The length of the fade at a new edge, in samples; 64 is Ardour's own.
     std::int64_t edgeFade = DefaultFade;

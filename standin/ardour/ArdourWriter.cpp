@@ -227,7 +227,7 @@ void ArdourWriter::writeSessionRange()
     // It ends where the project was set to end or, where nobody has done so, with the last clip if that ends elsewhere now.
     const SessionClock& clock = m_session.clock;
     std::int64_t samples = clock.samplesOf(m_project.setEndTime());
-    if (samples == m_session.sessionRange->end && contentEnd(m_project) != m_session.contentEnd)
+    if (!m_session.isEndSet && contentEnd(m_project) != m_session.contentEnd)
         samples = clock.samplesOf(contentEnd(m_project));
     samples = std::max(samples, m_session.sessionRange->start);
     if (samples == m_session.sessionRange->end)

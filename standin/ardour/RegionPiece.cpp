@@ -12,10 +12,12 @@
 
 #include <algorithm>
 #include <cmath>
+#include <optional>
 #include <set>
 #include <string>
 #include <string_view>
 #include <tuple>
+#include <utility>
 
 namespace standin {
 
@@ -97,21 +99,51 @@ void findSeams(const std::vector<SourcePiece>& pieces)
     }
 }
 
+/// Which samples of a region lie between two times from its start on, in seconds; nothing when there are none, or none but
+/// those next to a cut that is near to an edge.
+std::optional<std::pair<std::int64_t, std::int64_t>> stretchOf(const ArdourSession::Region& region, double start,
+                                                               double end, const SessionClock& clock)
+{
+    // One without a sample, which nobody can cut.
+    if (region.length == 0)
+        return std::pair<std::int64_t, std::int64_t>{};
+    const auto length = static_cast<double>(region.length);
+    // What is as near but for rounding isn't near.
+    const double near = std::min(NearToCut, length / 2.0) - 1e-6;
+    const auto rate = static_cast<double>(clock.sampleRate());
+    const bool begins = start * rate < near;
+    const bool ends = end * rate > length - near;
+    if (end * rate < near || start * rate > length - near)
+        return std::nullopt;
+    const std::int64_t first = begins ? 0 : clock.samplesOf(start);
+    const std::int64_t last = ends ? region.length : clock.samplesOf(end);
+    return last > first ? std::optional(std::pair(first, last)) : std::nullopt;
+}
+
+/// The nearest number of samples, the same there and back.
+std::int64_t distanceOf(double seconds, const SessionClock& clock)
+{
+    return seconds < 0.0 ? -clock.samplesOf(-seconds) : clock.samplesOf(seconds);
+}
+
 } // namespace
 
 std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std::vector<const ClipEvent*>& events,
                                   const SessionClock& clock)
 {
     std::vector<RegionPiece> pieces;
-    const double formerPlace = clock.secondsOf(region.position) - clock.secondsOf(region.start);
     for (const ClipEvent* const event : events) {
-        const std::int64_t moved = clock.samplesOf(event->start() - (formerPlace + event->sourceOffset()));
-        RegionPiece piece;
-        piece.position = clock.samplesOf(event->start());
-        piece.length = clock.samplesOf(event->end()) - piece.position;
-        piece.start = region.start + piece.position - moved - region.position;
-        if (piece.length <= 0)
+        const double offset = event->sourceOffset() - clock.secondsOf(region.start);
+        const std::int64_t moved = distanceOf(event->start() - offset - clock.secondsOf(region.position), clock);
+        const auto played = stretchOf(region, offset, offset + event->length(), clock);
+        if (!played || (region.length == 0 && moved != 0))
             continue;
+        RegionPiece piece;
+        const std::int64_t first = region.position + moved + played->first;
+        const std::int64_t below = std::max<std::int64_t>(-first, 0);
+        piece.position = first + below;
+        piece.start = region.start + played->first + below;
+        piece.length = played->second - played->first - below;
         if (piece.start > region.start || region.head)
             piece.head = RegionEdge::New;
         if (piece.start + piece.length < region.start + region.length || region.tail)

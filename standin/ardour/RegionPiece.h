@@ -45,8 +45,14 @@ struct RegionPieces {
     std::vector<RegionPiece> pieces;
 };
 
-/// The pieces that play something, in the order of the events. All samples of an event are moved by the same number of
-/// samples, the nearest to how far the event has moved. Each edge at which this run or an earlier one has cut is new.
+/// How near to a cut an edge of a region has to lie, in samples, to lie at that cut. Where a frame isn't a whole number of
+/// samples an editor puts the edge up to a sample beside the cut, and what has moved lies up to half a sample beside where
+/// it should.
+inline constexpr double NearToCut = 2.0;
+
+/// The pieces that play something, in the order of the events. A cut lies at the nearest sample of the region, on both of its
+/// sides, and one near to an edge at that edge. All samples of an event are moved by the same number of samples, the nearest
+/// to how far the event has moved. Each edge at which this run or an earlier one has cut is new.
 std::vector<RegionPiece> piecesOf(const ArdourSession::Region& region, const std::vector<const ClipEvent*>& events,
                                   const SessionClock& clock);
 

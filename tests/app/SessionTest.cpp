@@ -184,7 +184,7 @@ TEST_F(Session, HasFadesOfTheLengthThatIsAskedFor)
 
 TEST_F(Session, HasNoOtherLengthOfFades)
 {
-    for (const char* const length : {"-1", "10001", "x"})
+    for (const char* const length : {"-1", "10001", "x", "nan", "-nan"})
         EXPECT_EQ(apply({"-o", output, "--fade", length}).status, 2) << length;
     for (const char* const length : {"0", "10000"})
         EXPECT_EQ(apply({"-o", output, "--overwrite", "--fade", length}).status, 0) << length;

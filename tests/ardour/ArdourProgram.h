@@ -30,6 +30,12 @@ struct ArdourDump {
     std::vector<std::string> complaints;                                         ///< warnings and errors of the load
 };
 
+/// The left channel of an exported file.
+struct ArdourMix {
+    std::vector<float> left;
+    bool isWhole = false; ///< whether the file tells its length, and has it
+};
+
 /// The programs of Ardour, run without a display. Each call throws std::runtime_error with what the program said when it
 /// fails.
 class ArdourProgram {
@@ -47,7 +53,9 @@ public:
     static void resave(const std::filesystem::path& folder, const std::string& name);
     static ArdourDump dump(const std::filesystem::path& folder, const std::string& name,
                            const std::vector<std::int64_t>& samples);
-    /// The left channel of the mix over the session range.
+    /// What a WAV file of floats holds, to the end of the file if its header tells no length.
+    static ArdourMix mixIn(const std::filesystem::path& file);
+    /// The left channel of the mix over the session range. Exported again once if the file isn't whole.
     static std::vector<float> mix(const std::filesystem::path& folder, const std::string& name);
 };
 

@@ -4,6 +4,7 @@
 
 #include "tests/ardour/ArdourProgram.h"
 #include "tests/ardour/ConformedSession.h"
+#include "tests/support/TempFolder.h"
 #include "tests/support/TreePaths.h"
 
 #include <gtest/gtest.h>
@@ -12,6 +13,7 @@
 #include <algorithm>
 #include <cmath>
 #include <filesystem>
+#include <fstream>
 #include <random>
 #include <set>
 #include <sstream>
@@ -29,6 +31,36 @@ const Recut Film{250, {{100, 40}, {0, 37}, {-1, 25}, {37, 60}, {150, 100}, {20, 
 /// The same and its way back, where no shot is lost.
 const Recut Swapped{250, {{90, 160}, {0, 90}}};
 const Recut SwappedBack{250, {{160, 90}, {0, 160}}};
+
+/// A WAV file of two channels of floats whose header tells `size` bytes of sound.
+std::string waveOf(std::uint32_t size, const std::vector<float>& samples)
+{
+    const auto number = [](auto value) { return std::string(reinterpret_cast<const char*>(&value), sizeof value); };
+    std::string wave = "RIFF" + number(std::uint32_t{8}) + "WAVEfmt " + number(std::uint32_t{16});
+    wave += number(std::uint16_t{3}) + number(std::uint16_t{2}) + number(std::uint32_t{48000});
+    wave += number(std::uint32_t{384000}) + number(std::uint16_t{8}) + number(std::uint16_t{32});
+    wave += "data" + number(size);
+    for (const float sample : samples)
+        wave += number(sample);
+    return wave;
+}
+
+TEST(ArdourProgram, ReadsAMixToTheEndOfAFileWhoseHeaderWasLeftWithoutALength)
+{
+    const TempFolder folder;
+    const auto read = [&](const std::string& wave) {
+        std::ofstream(folder / "mix.wav", std::ios::binary) << wave;
+        const ArdourMix mix = ArdourProgram::mixIn(folder / "mix.wav");
+        return std::pair(mix.left, mix.isWhole);
+    };
+    const std::vector<float> sound{0.5F, 0.0F, 0.25F, 0.0F};
+    const std::vector<float> left{0.5F, 0.25F};
+    EXPECT_EQ(read(waveOf(16, sound)), std::pair(left, true));
+    EXPECT_EQ(read(waveOf(16, sound) + "LIST"), std::pair(left, true));
+    EXPECT_EQ(read(waveOf(0, sound)), std::pair(left, false));
+    EXPECT_EQ(read(waveOf(24, sound)), std::pair(left, false));
+    EXPECT_EQ(read("").second, false);
+}
 
 class InArdour : public testing::Test {
 protected:

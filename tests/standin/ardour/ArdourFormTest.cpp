@@ -9,6 +9,8 @@
 #include "standin/project/MediaClip.h"
 #include "standin/project/ProjectForm.h"
 #include "tests/standin/ardour/SessionText.h"
+#include "tests/support/NotQuadratic.h"
+#include "tests/support/SecondsOf.h"
 
 #include <gtest/gtest.h>
 #include <pugixml.hpp>
@@ -16,6 +18,8 @@
 #include <filesystem>
 #include <fstream>
 #include <set>
+#include <tuple>
+#include <utility>
 
 namespace standin::tests {
 
@@ -608,12 +612,79 @@ TEST(ArdourForm, WritesMarkersThatMovedDoubledAndWent)
     EXPECT_STREQ(written[2].attribute("end").value(), "a2822400000");
 }
 
+TEST(ArdourForm, ReadsAnEdgeJustOutsideOfAFrameAsOneAtTheFrame)
+{
+    // 37 and 91 frames of 29.97 a second at 48 kHz are 59,259.2 and 145,745.6 samples.
+    const SessionProject session(SessionText{.timecode = "timecode_2997", .regions = region(51, 59259, 86487, 100)});
+    const auto& event = static_cast<const ClipEvent&>(*session.track("Dia").firstChild());
+    EXPECT_NEAR(event.start() * 48000.0, 59259.2, 1e-6);
+    EXPECT_NEAR(event.end() * 48000.0, 145745.6, 1e-6);
+    EXPECT_NEAR(event.sourceOffset() * 48000.0, 100.2, 1e-6);
+    const auto edgesOf = [](const std::string& timecode, long position, long length) {
+        const SessionProject read(SessionText{.timecode = timecode, .regions = region(51, position, length)});
+        const Node& only = *read.track("Dia").firstChild();
+        return std::pair(only.start() * 48000.0, only.end() * 48000.0);
+    };
+    // Inside of the frames, two samples outside, at frames of whole samples.
+    for (const auto& [timecode, position, length] :
+         {std::tuple("timecode_2997", 59260L, 86485L), std::tuple("timecode_2997", 59257L, 86491L),
+          std::tuple("timecode_25", 1919L, 1922L), std::tuple("timecode_2997", 59258L, 4L)}) {
+        const auto [start, end] = edgesOf(timecode, position, length);
+        EXPECT_NEAR(start, static_cast<double>(position), 1e-6);
+        EXPECT_NEAR(end, static_cast<double>(position + length), 1e-6);
+    }
+}
+
+TEST(ArdourForm, WritesARegionThatEndsTwoSamplesAfterAFrameAsItWas)
+{
+    // 255 frames of 29.97 a second are 408,408 samples.
+    for (const long end : {408409L, 408410L, 408411L}) {
+        const std::string text = SessionText{.timecode = "timecode_2997", .regions = region(51, 313288, end - 313288)};
+        EXPECT_EQ(SessionProject(text).text(), text) << end;
+    }
+}
+
+TEST(ArdourForm, KeepsARegionThatIsShorterThanASample)
+{
+    std::string text = SessionText{.regions = region(51, 48000, 1)};
+    text.replace(text.find("length=\"a5880@"), 14, "length=\"a5000@");
+    EXPECT_EQ(SessionProject(text).text(), text);
+}
+
+TEST(ArdourForm, ReadsManyRoutesInTimeThatGrowsWithThem)
+{
+    cadrel::tests::expectNotQuadratic(1500, [](int routes) {
+        SessionText text;
+        for (int route = 0; route < routes; ++route) {
+            const std::string id = std::to_string(100000 + 2 * route);
+            const std::string list = std::to_string(100001 + 2 * route);
+            text.routes += "<Route id=\"" + id + R"(" name="t" default-type="audio" audio-playlist=")" + list + "\"/>";
+            text.playlists += "<Playlist id=\"" + list + R"(" name="t" type="audio"/>)";
+        }
+        return cadrel::tests::secondsOf([&] {
+            const SessionProject session(text);
+            EXPECT_EQ(session.project->allTracks().size(), static_cast<std::size_t>(routes) + 1);
+        });
+    });
+}
+
 TEST(ArdourForm, EndsTheSessionRangeWithTheProgramme)
 {
     const SessionProject session(SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange"),
                                              .regions = region(51, 0, 96000)});
     eventAt(session.track("Dia"), 0).setSpan(20.0, 22.0);
     EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a6209280000");
+}
+
+TEST(ArdourForm, EndsTheSessionRangeWhereTheProjectWasSetToEndEvenIfThatIsWhereItEnded)
+{
+    const SessionProject session(SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange"),
+                                             .regions = region(51, 0, 480000)});
+    eventAt(session.track("Dia"), 0).setSpan(0.0, 8.0);
+    session.project->setProjectEnd(10.0);
+    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a2822400000");
+    session.project->setProjectEnd(9.0);
+    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a2540160000");
 }
 
 TEST(ArdourForm, RefusesAClipThatTheSessionDoesNotHave)

@@ -4,6 +4,7 @@
 #include "standin/base/ObjectList.h"
 #include "standin/edit/EditService.h"
 #include "standin/edit/ProjectManager.h"
+#include "standin/edit/RangeEdits.h"
 #include "standin/project/AutomationPoint.h"
 #include "tests/standin/ardour/SessionText.h"
 
@@ -14,8 +15,10 @@
 #include <algorithm>
 #include <cmath>
 #include <map>
+#include <numeric>
 #include <set>
 #include <sstream>
+#include <tuple>
 
 using namespace Velmark;
 
@@ -124,6 +127,19 @@ std::vector<Played> playedAt(const Track& track, long sample)
     return played;
 }
 
+/// Whether a sample is near to an edge at a frame, where all that has been rounded may part the two by a few samples.
+bool isNearToCut(const Track& track, long sample)
+{
+    for (const Node* node = track.firstChild(); node; node = track.childBehind(*node)) {
+        for (const double edge : {node->start(), node->end()}) {
+            const double toFrame = (edge - std::round(edge / Frame) * Frame) * SampleRate;
+            if (std::abs(toFrame) < 4.0 && std::abs(edge * SampleRate - static_cast<double>(sample)) < 4.0)
+                return true;
+        }
+    }
+    return false;
+}
+
 std::set<long> edgesOf(const Track& track)
 {
     std::set<long> edges{0};
@@ -170,6 +186,8 @@ RC_GTEST_PROP(ArdourLaw, WhatIsWrittenPlaysTheSameSamplesAsTheProject, ())
     std::set<long> samples = edgesOf(edited);
     samples.merge(edgesOf(read));
     for (const long sample : samples) {
+        if (isNearToCut(edited, sample) || isNearToCut(read, sample))
+            continue;
         const std::vector<Played> expected = playedAt(edited, sample);
         const std::vector<Played> written = playedAt(read, sample);
         RC_ASSERT(written.size() == expected.size());
@@ -178,6 +196,137 @@ RC_GTEST_PROP(ArdourLaw, WhatIsWrittenPlaysTheSameSamplesAsTheProject, ())
             RC_ASSERT(std::abs(written[index].source - expected[index].source) <= 0.5 + 1e-4);
         }
     }
+}
+
+/// A film of shots with frames that may be no whole number of samples, one region to each shot and one over all of them.
+class ShotsAtARate {
+public:
+    ShotsAtARate()
+    {
+        struct Rate {
+            std::string format;
+            double framesPerSecond;
+        };
+        const auto rate = *rc::gen::elementOf(std::vector<Rate>{{"timecode_23976", 24000.0 / 1001.0},
+                                                                {"timecode_24", 24.0},
+                                                                {"timecode_25", 25.0},
+                                                                {"timecode_2997", 30000.0 / 1001.0},
+                                                                {"timecode_30", 30.0},
+                                                                {"timecode_5994", 60000.0 / 1001.0}});
+        samplesPerSecond = *rc::gen::elementOf(std::vector<long>{44100, 48000, 96000});
+        frame = 1.0 / rate.framesPerSecond;
+        // Rounded as one editor or another does it.
+        const double upwards = *rc::gen::elementOf(std::vector<double>{0.0, 0.5, 1.0 - 1e-6});
+        const auto lengths = *rc::gen::container<std::vector<int>>(rc::gen::inRange(2, 40));
+        cuts.push_back(0);
+        for (const int length : lengths)
+            cuts.push_back(cuts.back() + length);
+        SessionText text{.sampleRate = std::to_string(samplesPerSecond), .timecode = rate.format};
+        const auto sampleAt = [&](int cut) {
+            return static_cast<long>(std::floor(cut * frame * static_cast<double>(samplesPerSecond) + upwards + 1e-7));
+        };
+        for (std::size_t shot = 0; shot + 1 < cuts.size(); ++shot)
+            text.regions += regionAt(100 + static_cast<int>(shot), sampleAt(cuts[shot]), sampleAt(cuts[shot + 1]));
+        if (!lengths.empty())
+            text.regions += regionAt(99, 0, sampleAt(cuts.back()));
+        session = text;
+    }
+
+    /// Name, position, length and start of each region in a session, in order.
+    using Regions = std::multiset<std::tuple<std::string, long, long, long>>;
+    Regions regionsOf(const std::string& text) const
+    {
+        pugi::xml_document document;
+        RC_ASSERT(static_cast<bool>(document.load_string(text.c_str())));
+        Regions regions;
+        for (const pugi::xpath_node& found : document.select_nodes("//Playlist/Region")) {
+            const std::string length = found.node().attribute("length").value();
+            regions.emplace(found.node().attribute("name").value(), samplesIn(length.substr(length.find('@') + 1)),
+                            samplesIn(length), samplesIn(found.node().attribute("start").value()));
+        }
+        return regions;
+    }
+    /// The session after frames from the first of `from` on have come to `to`, shot by shot.
+    std::string moved(const std::string& text, const std::vector<int>& from, const std::vector<int>& to) const
+    {
+        EditedSession edited(text);
+        edited.application.edits().begin(true);
+        const auto tracks = create<IObjectList>(edited.application.context());
+        for (Track* const track : edited.project.allTracks())
+            tracks->add(static_cast<ITrackNode*>(track), 0);
+        for (std::size_t shot = 0; shot < from.size(); ++shot) {
+            const int length = cuts[shot + 1] - cuts[shot];
+            RC_ASSERT(edited.application.edits().copyRange(&edited.project, tracks.get(), 0, from[shot] * frame,
+                                                           (from[shot] + length) * frame,
+                                                           to[shot] * frame) == ResultOk);
+        }
+        const int first = *std::ranges::min_element(from);
+        clearRange(edited.project.allTracks(), first == 0 ? 0.0 : (first - 1) * frame,
+                   first == 0 ? (cuts.back() + 1) * frame : (first + cuts.back() + 1) * frame);
+        edited.application.edits().commit(&edited.project, u"Conform");
+        return edited.text();
+    }
+
+    long samplesPerSecond;
+    double frame;
+    std::vector<int> cuts;
+    std::string session;
+
+private:
+    std::string regionAt(int id, long from, long to) const
+    {
+        const auto time = [&](long samples) {
+            return std::string("a").append(std::to_string(samples * (282240000 / samplesPerSecond)));
+        };
+        return "<Region name=\"r" + std::to_string(id) + "\" start=\"" + time(from) + "\" length=\"" + time(to - from) +
+               "@" + time(from) + "\" id=\"" + std::to_string(id) + R"(" type="audio" source-0="11"/>)";
+    }
+    long samplesIn(const std::string& time) const { return std::stol(time.substr(1)) / (282240000 / samplesPerSecond); }
+};
+
+RC_GTEST_PROP(ArdourLaw, ShotsThatAreShuffledAndPutBackHaveTheirRegionsAtEveryRate, ())
+{
+    const ShotsAtARate film;
+    RC_PRE(film.cuts.size() > 1);
+    const std::size_t count = film.cuts.size() - 1;
+    std::vector<std::size_t> order(count);
+    std::iota(order.begin(), order.end(), 0);
+    // The new programme lies behind the old one, the shots in another order.
+    for (std::size_t shot = count; shot > 1; --shot)
+        std::swap(order[shot - 1], order[*rc::gen::resize(100, rc::gen::inRange<std::size_t>(0, shot))]);
+    const std::vector<int> old(film.cuts.begin(), film.cuts.end() - 1);
+    std::vector<int> cut(count);
+    int place = film.cuts.back() + *rc::gen::inRange(2, 40);
+    for (const std::size_t shot : order) {
+        cut[shot] = place;
+        place += film.cuts[shot + 1] - film.cuts[shot];
+    }
+    const std::string there = film.moved(film.session, old, cut);
+    const auto before = film.regionsOf(film.session);
+    const auto between = film.regionsOf(there);
+    // One for each shot and as many pieces of the one over all.
+    RC_ASSERT(between.size() == 2 * count);
+    for (const auto& [name, position, length, start] : between) {
+        RC_ASSERT(length > 300);
+        if (name == "r99")
+            continue;
+        const auto same = [&, named = name](const auto& region) { return std::get<0>(region) == named; };
+        const auto found = std::ranges::find_if(before, same);
+        RC_ASSERT(found != before.end());
+        RC_ASSERT(std::get<2>(*found) == length);
+        RC_ASSERT(std::get<3>(*found) == start);
+    }
+    long played = 0;
+    for (const auto& [name, position, length, start] : film.regionsOf(film.moved(there, cut, old))) {
+        RC_ASSERT(position == start);
+        if (name == "r99") {
+            RC_ASSERT(position == played);
+            played = position + length;
+        } else {
+            RC_ASSERT(before.contains({name, position, length, start}));
+        }
+    }
+    RC_ASSERT(before.contains({"r99", 0, played, 0}));
 }
 
 RC_GTEST_PROP(ArdourLaw, WhatIsWrittenHasTheAutomationOfTheProject, ())

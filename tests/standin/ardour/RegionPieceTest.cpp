@@ -140,6 +140,96 @@ TEST(RegionPiece, IsNoneWhenItPlaysNotASample)
     EXPECT_TRUE(piecesOf(Whole, {event.get()}, clock).empty());
 }
 
+/// What is played of the region when the programme is cut at a place, in samples, and its parts move apart.
+std::vector<RegionPiece> cutAt(double place, const ArdourSession::Region& region = Whole)
+{
+    const SessionClock clock = clockAt("48000");
+    const double start = clock.secondsOf(region.position);
+    const double end = clock.secondsOf(region.position + region.length);
+    const auto head = eventOf(region, clock, start, place / 48000.0, 1.0);
+    const auto tail = eventOf(region, clock, place / 48000.0, end, 5.0);
+    return piecesOf(region, {head.get(), tail.get()}, clock);
+}
+
+TEST(RegionPiece, IsAllOfARegionThatIsCutLessThanTwoSamplesFromItsEdge)
+{
+    for (const double place : {1000.2, 1000.8, 1001.9}) {
+        const auto pieces = cutAt(place);
+        ASSERT_EQ(pieces.size(), 1U) << place;
+        EXPECT_EQ(pieces[0].position, 1000 + 240000);
+        EXPECT_EQ(pieces[0].length, 10000);
+        EXPECT_EQ(pieces[0].head, RegionEdge::Old);
+    }
+    for (const double place : {10998.1, 10999.2, 10999.8}) {
+        const auto pieces = cutAt(place);
+        ASSERT_EQ(pieces.size(), 1U) << place;
+        EXPECT_EQ(pieces[0].position, 1000 + 48000);
+        EXPECT_EQ(pieces[0].length, 10000);
+        EXPECT_EQ(pieces[0].tail, RegionEdge::Old);
+    }
+    for (const double place : {1002.0, 1002.1, 10997.9, 10998.0})
+        EXPECT_EQ(cutAt(place).size(), 2U) << place;
+}
+
+TEST(RegionPiece, IsPlayedOnceHoweverShortItsRegionIs)
+{
+    for (const std::int64_t length : {1, 2, 3, 4, 5}) {
+        const ArdourSession::Region region{{}, 1000, length, 500};
+        for (int tenth = 0; tenth <= 10 * length; ++tenth) {
+            std::int64_t played = 0;
+            for (const RegionPiece& piece : cutAt(1000.0 + tenth / 10.0, region))
+                played += piece.length;
+            EXPECT_EQ(played, length) << tenth;
+        }
+    }
+}
+
+TEST(RegionPiece, IsCutAtTheSameSampleOnBothSides)
+{
+    const SessionClock clock = clockAt("48000");
+    // 3,200.6 samples lie nearer to 3,201; so does 800.8 by which the second part has moved, to 801.
+    const auto head = eventOf(Whole, clock, 1000 / 48000.0, 3200.6 / 48000.0, 0.0);
+    const auto tail = eventOf(Whole, clock, 3200.6 / 48000.0, 11000 / 48000.0, 800.8 / 48000.0);
+    const auto pieces = piecesOf(Whole, {head.get(), tail.get()}, clock);
+    ASSERT_EQ(pieces.size(), 2U);
+    EXPECT_EQ(pieces[0].start + pieces[0].length, 500 + 2201);
+    EXPECT_EQ(pieces[1].start, 500 + 2201);
+    EXPECT_EQ(pieces[1].position, 3201 + 801);
+}
+
+TEST(RegionPiece, MovesByTheSameSamplesThereAndBack)
+{
+    const SessionClock clock = clockAt("48000");
+    const auto there = eventOf(Whole, clock, 1000 / 48000.0, 11000 / 48000.0, 800.5 / 48000.0);
+    EXPECT_EQ(piecesOf(Whole, {there.get()}, clock).at(0).position, 1801);
+    const ArdourSession::Region moved{{}, 1801, 10000, 500};
+    const auto back = eventOf(moved, clock, 1801 / 48000.0, 11801 / 48000.0, -800.5 / 48000.0);
+    EXPECT_EQ(piecesOf(moved, {back.get()}, clock).at(0).position, 1000);
+}
+
+TEST(RegionPiece, BeginsNotBeforeTheSession)
+{
+    const SessionClock clock = clockAt("48000");
+    const auto event = eventOf(Whole, clock, 1001.4 / 48000.0, 11000 / 48000.0, -1001.4 / 48000.0);
+    const auto pieces = piecesOf(Whole, {event.get()}, clock);
+    ASSERT_EQ(pieces.size(), 1U);
+    EXPECT_EQ(pieces[0].position, 0);
+    EXPECT_EQ(pieces[0].start, 501);
+    EXPECT_EQ(pieces[0].length, 9999);
+}
+
+TEST(RegionPiece, StaysWithoutASampleWhereItsRegionHasNone)
+{
+    const ArdourSession::Region none{{}, 1000, 0, 500};
+    const SessionClock clock = clockAt("48000");
+    const auto left = eventOf(none, clock, 1000 / 48000.0, 1000 / 48000.0, 0.0);
+    const auto pieces = piecesOf(none, {left.get()}, clock);
+    ASSERT_EQ(pieces.size(), 1U);
+    EXPECT_TRUE(pieces[0].isAll(none));
+    const auto moved = eventOf(none, clock, 1000 / 48000.0, 1000 / 48000.0, 1.0);
+    EXPECT_TRUE(piecesOf(none, {moved.get()}, clock).empty());
+}
+
 /// Cuts at frames of 30000/1001 a second don't fall on samples; all pieces of a stretch move by the same samples, and leave
 /// neither a hole nor an overlap.
 RC_GTEST_PROP(RegionPieceLaw, AllOfAStretchMovesByTheSameSamplesAndStaysWhole, ())
