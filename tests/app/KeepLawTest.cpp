@@ -491,6 +491,8 @@ void requireThatOnlyOnePlaceChanges(const std::string& path, const TreeEdl& edl,
     const double resume = change.removed.end / framerate.rate - origin;
     const double end = reel.end / framerate.rate - origin;
     const double shift = change.shift() / framerate.rate;
+    // The automation keeps its value where a later reel, with what belongs to it, begins and ends.
+    const double programmeEnd = (picture.back().end + core::partingGap(framerate)) / framerate.rate - origin;
     constexpr double Instant = 1e-4;
     const std::vector<json> before = changeableTracks(project.at("tracks"));
     const std::vector<json> after = changeableTracks(tracksIn(run.result));
@@ -531,7 +533,7 @@ void requireThatOnlyOnePlaceChanges(const std::string& path, const TreeEdl& edl,
             }
             RC_ASSERT(!is.empty());
             RC_ASSERT(is.back().at("time").get<double>() <
-                      std::max(end, old.back().at("time").get<double>()) + std::max(shift, 0.0) + 1.0);
+                      std::max(programmeEnd, old.back().at("time").get<double>()) + std::max(shift, 0.0) + 1.0);
             for (double part = 0.01; part < 1.0; part += 0.07) {
                 const double early = start * part;
                 const double late = resume + (end - resume) * part;
