@@ -61,6 +61,7 @@ private:
     juce::StringArray getMenuBarNames() override;
     juce::PopupMenu getMenuForIndex(int index, const juce::String& name) override;
     void menuItemSelected(int command, int index) override;
+    using juce::Component::keyPressed;
     bool keyPressed(const juce::KeyPress& key, juce::Component* origin) override;
     void layOut();
 
