@@ -20,7 +20,7 @@ public:
 private:
     void confirm() override {}
     void cancel() override;
-    juce::Component* firstFocus() override { return &m_cancel; }
+    juce::Component* firstFocus() override { return m_cancel.isVisible() ? &m_cancel : nullptr; }
     void layOut() override;
 
     standin::UserBoxes::Progress m_progress;
