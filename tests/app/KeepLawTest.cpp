@@ -532,8 +532,14 @@ void requireThatOnlyOnePlaceChanges(const std::string& path, const TreeEdl& edl,
                     RC_ASSERT(std::find(is.begin(), is.end(), point) != is.end());
             }
             RC_ASSERT(!is.empty());
-            RC_ASSERT(is.back().at("time").get<double>() <
-                      std::max(programmeEnd, old.back().at("time").get<double>()) + std::max(shift, 0.0) + 1.0);
+            const double oldEnd = std::max(end, old.back().at("time").get<double>()) + std::max(shift, 0.0) + 1.0;
+            const double isEnd = is.back().at("time").get<double>();
+            RC_ASSERT(isEnd < std::max(oldEnd, programmeEnd + std::max(shift, 0.0) + 1.0));
+            // Nothing but the one edge lies after all that was there, and from there on the curve is as it was.
+            for (const json& point : is)
+                RC_ASSERT(point.at("time").get<double>() < oldEnd || point.at("time").get<double>() > isEnd - Instant);
+            if (isEnd >= oldEnd)
+                RC_ASSERT(std::abs(valueAt(is, isEnd + 1.0) - valueAt(old, isEnd + 1.0)) < 1e-6);
             for (double part = 0.01; part < 1.0; part += 0.07) {
                 const double early = start * part;
                 const double late = resume + (end - resume) * part;
