@@ -87,7 +87,9 @@ AvOwner<AVCodecContext> openDecoder(const AVStream& stream, Deadline deadline)
 {
     const AVCodecParameters& parameters = *stream.codecpar;
     const AVCodec* const codec = avcodec_find_decoder(parameters.codec_id);
-    if (!codec || !isPositive(stream.time_base))
+    if (!codec)
+        throw VideoError(Reason::UnknownKind);
+    if (!isPositive(stream.time_base))
         throw VideoError(Reason::Broken);
     auto decoder = owned(avcodec_alloc_context3(codec));
     if (avcodec_parameters_to_context(decoder.get(), &parameters) < 0)

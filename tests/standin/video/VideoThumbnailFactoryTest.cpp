@@ -213,7 +213,7 @@ TEST(VideoThumbnailFactory, DoesNotWaitForWhatComesThroughAPipe)
     const fs::path pipe = host.folder / "pipe.mov";
     ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
 
-    host.expectReason(host.addVideo(u"pipe.mov", 4.0), 0, VideoError::Reason::Broken, {pipe});
+    host.expectReason(host.addVideo(u"pipe.mov", 4.0), 0, VideoError::Reason::NotOpened, {pipe});
 
     EXPECT_EQ(host.numberAt(host.addVideo(videoOf(Film).u16string().c_str(), 4.0), 40), 40);
 }
