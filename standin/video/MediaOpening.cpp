@@ -37,9 +37,7 @@ AvOwner<AVIOContext> openBytes(const fs::path& file, const AVIOInterruptCB& inte
     const int error =
         avio_open2(&bytes, ("file:" + fs::absolute(file).string()).c_str(), AVIO_FLAG_READ, &interrupt, nullptr);
     if (error < 0)
-        throw VideoError(isOver(deadline)           ? Reason::TooSlow
-                         : error == AVERROR(ENOENT) ? Reason::Missing
-                                                    : Reason::NotOpened);
+        throwFailure(deadline, error == AVERROR(ENOENT) ? Reason::Missing : Reason::NotOpened);
     return AvOwner<AVIOContext>(bytes);
 }
 
@@ -64,14 +62,14 @@ AvOwner<AVFormatContext> openMedia(const fs::path& file, const Deadline& deadlin
     av_dict_free(&options);
     // What fails to open is freed, without what it reads from.
     if (error < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, Reason::Unreadable);
     static_cast<void>(bytes.release());
     return AvOwner<AVFormatContext>(format);
 }
 
-void throwFailure(Deadline deadline)
+void throwFailure(Deadline deadline, VideoError::Reason reason)
 {
-    throw VideoError(isOver(deadline) ? Reason::TooSlow : Reason::Broken);
+    throw VideoError(isOver(deadline) ? Reason::TooSlow : reason);
 }
 
 } // namespace standin

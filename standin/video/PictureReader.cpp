@@ -69,7 +69,7 @@ void findStreams(AVFormatContext& format, Deadline deadline)
     for (AVDictionary* dictionary : perStream)
         av_dict_free(&dictionary);
     if (found < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, Reason::Unreadable);
 }
 
 /// The video; nothing else is read from then on.
@@ -93,13 +93,13 @@ AvOwner<AVCodecContext> openDecoder(const AVStream& stream, Deadline deadline)
         throw VideoError(Reason::Broken);
     auto decoder = owned(avcodec_alloc_context3(codec));
     if (avcodec_parameters_to_context(decoder.get(), &parameters) < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, Reason::Broken);
     decoder->pkt_timebase = stream.time_base;
     AVDictionary* options = decoderOptions().release();
     const int error = avcodec_open2(decoder.get(), codec, &options);
     av_dict_free(&options);
     if (error < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, Reason::Broken);
     return decoder;
 }
 

@@ -11,6 +11,8 @@ const char* VideoError::what() const noexcept
         return "The file is missing.";
     case Reason::NotOpened:
         return "The file can't be opened.";
+    case Reason::Unreadable:
+        return "The file has no picture or sound that can be read.";
     case Reason::NoPicture:
         return "The file has no picture.";
     case Reason::NoSound:

@@ -88,12 +88,12 @@ TEST(VideoFault, ThePictureOfAnAlbumIsNoFilm)
     EXPECT_EQ(reasonToOpen(album), Reason::NoPicture);
 }
 
-TEST(VideoFault, WhatIsNoVideoIsBroken)
+TEST(VideoFault, WhatIsNoVideoCantBeRead)
 {
     const TempFolder folder;
 
-    EXPECT_EQ(reasonToOpen(folder.write("empty.mov", "")), Reason::Broken);
-    EXPECT_EQ(reasonToOpen(folder.write("text.mov", "This is a text, not a film.\n")), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.write("empty.mov", "")), Reason::Unreadable);
+    EXPECT_EQ(reasonToOpen(folder.write("text.mov", "This is a text, not a film.\n")), Reason::Unreadable);
 }
 
 TEST(VideoFault, WhatIsNoFileIsNotOpened)
@@ -145,10 +145,10 @@ TEST(VideoFault, NoOtherFileIsOpenedThanTheOneThatIsNamed)
     for (const std::string& other : {std::string("http://127.0.0.1:9/film.ts"), (folder / "pipe.ts").string(),
                                      std::string("pipe.ts"), std::string("film.ts")}) {
         const std::string list = "#EXTM3U\n#EXT-X-TARGETDURATION:4\n#EXTINF:4,\n" + other + "\n#EXT-X-ENDLIST\n";
-        EXPECT_EQ(reasonToOpen(folder.write("list.m3u8", list)), Reason::Broken) << other;
-        EXPECT_EQ(reasonToOpen(folder.write("list.mov", list)), Reason::Broken) << other;
+        EXPECT_EQ(reasonToOpen(folder.write("list.m3u8", list)), Reason::Unreadable) << other;
+        EXPECT_EQ(reasonToOpen(folder.write("list.mov", list)), Reason::Unreadable) << other;
         EXPECT_EQ(reasonToOpen(folder.write("joined.mov", "ffconcat version 1.0\nfile '" + other + "'\n")),
-                  Reason::Broken)
+                  Reason::Unreadable)
             << other;
     }
     EXPECT_EQ(reasonToOpen("http://127.0.0.1:9/film.mp4"), Reason::Missing);
@@ -183,13 +183,13 @@ TEST(VideoFault, AFileThatLostItsEndHasNoMoreThanIsLeft)
     EXPECT_EQ(reasonOf([&] { file.picture(199, {25, 1}, Box, inGoodTime()); }), Reason::PastTheEnd);
 }
 
-TEST(VideoFault, AFileThatLostItsIndexIsBroken)
+TEST(VideoFault, AFileThatLostItsIndexCantBeRead)
 {
     const TempFolder folder;
     // The index of this one stands at its end.
     const std::string whole = contentOf(videoOf({"index-last.mp4", 100, "25", H264}));
 
-    EXPECT_EQ(reasonToOpen(folder.write("half.mp4", whole.substr(0, whole.size() / 2))), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.write("half.mp4", whole.substr(0, whole.size() / 2))), Reason::Unreadable);
 }
 
 TEST(VideoFault, TheFramesAroundABrokenPartAreStillShown)
@@ -241,7 +241,7 @@ TEST(VideoFault, TimesThatNoFilmHasAreNone)
     }
 }
 
-TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeIsBroken)
+TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeCantBeRead)
 {
     const TempFolder folder;
     std::string bytes = contentOf(videoOf(Film));
@@ -250,7 +250,7 @@ TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeIsBroken)
     ASSERT_NE(table, std::string::npos);
     bytes.replace(table + 8, 8, std::string("\x00\x00\x00\x00\x1f\xff\xff\x00", 8));
 
-    EXPECT_EQ(reasonToOpen(folder.write("greedy.mp4", bytes)), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.write("greedy.mp4", bytes)), Reason::Unreadable);
 }
 
 TEST(VideoFault, APictureOfTooManyPixelsIsNotRead)
@@ -316,8 +316,8 @@ TEST(VideoError, EachReasonHasASentenceOfItsOwn)
 {
     std::set<std::string> sentences;
     for (const Reason reason :
-         {Reason::Missing, Reason::NotOpened, Reason::NoPicture, Reason::NoSound, Reason::UnknownKind, Reason::Broken,
-          Reason::TooLarge, Reason::TooSlow, Reason::PastTheEnd}) {
+         {Reason::Missing, Reason::NotOpened, Reason::Unreadable, Reason::NoPicture, Reason::NoSound,
+          Reason::UnknownKind, Reason::Broken, Reason::TooLarge, Reason::TooSlow, Reason::PastTheEnd}) {
         const std::string sentence = VideoError(reason).what();
         EXPECT_TRUE(sentence.ends_with(".")) << sentence;
         EXPECT_TRUE(sentences.insert(sentence).second) << sentence;
