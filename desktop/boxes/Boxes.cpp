@@ -19,10 +19,12 @@ constexpr std::chrono::milliseconds ProgressInterval(30);
 Boxes::Boxes(EventLoop& loop, juce::Component& window, juce::Component& beneath, std::filesystem::path home)
     : m_loop(loop), m_window(window), m_beneath(beneath), m_folders(std::move(home))
 {
+    juce::Desktop::getInstance().addFocusChangeListener(this);
 }
 
 Boxes::~Boxes()
 {
+    juce::Desktop::getInstance().removeFocusChangeListener(this);
     if (m_progress)
         hide(*m_progress);
 }
@@ -86,6 +88,13 @@ void Boxes::endProgress()
         return;
     hide(*m_progress);
     m_progress.reset();
+}
+
+/// When a window gets the keyboard from another program, JUCE gives it to what had it before, even if a box has come up since.
+void Boxes::globalFocusChanged(juce::Component* focused)
+{
+    if (focused && !m_open.empty() && m_window.isParentOf(focused))
+        m_open.back()->keepFocus(*focused);
 }
 
 void Boxes::show(Box& box)
