@@ -86,13 +86,13 @@ void Box::parentHierarchyChanged()
     fillParent();
 }
 
-void Box::keepFocus(juce::Component& focused)
+void Box::keepFocus(juce::Component* focused)
 {
-    if (isParentOf(&focused))
-        m_lastFocus = &focused;
+    if (isParentOf(focused))
+        m_lastFocus = focused;
     else if (m_lastFocus && m_lastFocus->isShowing())
         m_lastFocus->grabKeyboardFocus();
-    else if (&focused != this)
+    else if (focused != this)
         takeFocus();
 }
 

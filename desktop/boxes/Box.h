@@ -13,9 +13,9 @@ class Box : public cadrel::gui::Sheet {
 public:
     Box(const juce::String& name, const juce::String& title);
 
-    /// To be told what has the keyboard in the window. Where that isn't one of the box's controls, as after a click beside them,
-    /// the control gets it back that had it last.
-    void keepFocus(juce::Component& focused);
+    /// To be told over and over what has the keyboard in the window, or null. Where that isn't one of the box's controls, as after
+    /// a click beside them, the control gets it back that had it last.
+    void keepFocus(juce::Component* focused);
 
     /// Whether the user is done with it.
     bool isDone() const { return m_isDone; }

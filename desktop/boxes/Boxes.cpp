@@ -19,12 +19,10 @@ constexpr std::chrono::milliseconds ProgressInterval(30);
 Boxes::Boxes(EventLoop& loop, juce::Component& window, juce::Component& beneath, std::filesystem::path home)
     : m_loop(loop), m_window(window), m_beneath(beneath), m_folders(std::move(home))
 {
-    juce::Desktop::getInstance().addFocusChangeListener(this);
 }
 
 Boxes::~Boxes()
 {
-    juce::Desktop::getInstance().removeFocusChangeListener(this);
     if (m_progress)
         hide(*m_progress);
 }
@@ -76,6 +74,7 @@ bool Boxes::showProgress(const Progress& progress)
     } else if (now - m_progressServed < ProgressInterval)
         return m_progress->isCancelled();
     m_progress->update(progress);
+    keepKeyboard();
     m_loop.turnWithoutWaiting();
     m_progressServed = Clock::now();
     return m_progress->isCancelled();
@@ -88,13 +87,6 @@ void Boxes::endProgress()
         return;
     hide(*m_progress);
     m_progress.reset();
-}
-
-/// When a window gets the keyboard from another program, JUCE gives it to what had it before, even if a box has come up since.
-void Boxes::globalFocusChanged(juce::Component* focused)
-{
-    if (focused && !m_open.empty() && m_window.isParentOf(focused))
-        m_open.back()->keepFocus(*focused);
 }
 
 void Boxes::show(Box& box)
@@ -121,8 +113,20 @@ void Boxes::hide(Box& box)
 void Boxes::run(Box& box)
 {
     show(box);
-    m_loop.runUntil([&] { return box.isDone(); });
+    m_loop.runUntil([&] {
+        keepKeyboard();
+        return box.isDone();
+    });
     hide(box);
+}
+
+/// A window that gets the keyboard from another one gives it to what had it before, or to nothing, even if a box has come up since.
+void Boxes::keepKeyboard()
+{
+    juce::Component* const focused = juce::Component::getCurrentlyFocusedComponent();
+    const juce::ComponentPeer* const peer = m_window.getPeer();
+    if (focused ? m_window.isParentOf(focused) : peer && peer->isFocused())
+        m_open.back()->keepFocus(focused);
 }
 
 } // namespace desktop

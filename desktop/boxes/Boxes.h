@@ -16,7 +16,7 @@
 namespace desktop {
 
 /// The boxes of the host as sheets over its window. While one is open, nothing beneath it takes input, and it goes on painting.
-class Boxes : public standin::UserBoxes, private juce::FocusChangeListener {
+class Boxes : public standin::UserBoxes {
 public:
     /// Called with true before the first box comes up and with false after the last one has gone.
     using OpenChanged = std::function<void(bool isOpen)>;
@@ -41,10 +41,11 @@ private:
 
     std::size_t ask(const juce::String& title, const juce::String& message, const juce::StringArray& buttons,
                     std::size_t byReturn);
-    void globalFocusChanged(juce::Component* focused) override;
     void show(Box& box);
     void hide(Box& box);
     void run(Box& box);
+    /// Leaves the keyboard of the window to the box in front.
+    void keepKeyboard();
 
     EventLoop& m_loop;
     juce::Component& m_window;

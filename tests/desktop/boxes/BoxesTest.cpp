@@ -120,7 +120,6 @@ TEST_F(BoxesTest, LeaveTheKeyboardToTheButtonThatHasItAfterAClickBesideThem)
 {
     const auto focused = [] { return juce::Component::getCurrentlyFocusedComponent(); };
     const juce::Component* second = nullptr;
-    will([] {}); // The news of the first focus comes with a message.
     will([&] {
         focused()->moveKeyboardFocusToSibling(true);
         second = focused();
@@ -145,6 +144,15 @@ TEST_F(BoxesTest, TakeTheKeyboardFromWhatLiesBeneathThem)
     will([this] { EXPECT_FALSE(m_button.hasKeyboardFocus(true)); });
     willPress(juce::KeyPress::returnKey);
     EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Cancel"}), 0U);
+}
+
+TEST_F(BoxesTest, TakeTheKeyboardThatNothingInTheWindowHas)
+{
+    will([] { juce::Component::unfocusAllComponents(); });
+    will([] {});
+    will([] { EXPECT_TRUE(juce::Component::getCurrentlyFocusedComponent()); });
+    willPress(juce::KeyPress::escapeKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Cancel"}), 1U);
 }
 
 TEST_F(BoxesTest, TellTheIdleWorkWhetherItIsCalledFromWithinAnother)

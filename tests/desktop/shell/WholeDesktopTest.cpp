@@ -369,14 +369,18 @@ TEST_P(WholeDesktopTest, GivesTheKeysToAQuestionHoweverItWasClickedFor)
     addCuts();
     m_user->click(DesktopUser::Main, "Generate Button");
     m_user->save();
+    int boxes = 0;
     for (const int pause : {0, 30, 90, 200}) {
         SCOPED_TRACE(testing::Message() << pause << " ms between the clicks");
         m_user->doubleClick(DesktopUser::Main, "Cadrel Button", std::chrono::milliseconds(pause));
         m_user->waitForBox(true);
-        m_user->waitForRest(10);
-        m_user->press(XK_Escape);
+        // The second click may have asked for another one.
+        do {
+            m_user->waitForRest(10);
+            m_user->press(XK_Escape);
+            m_user->waitForRest(10);
+        } while (m_user->isBoxOpen() && ++boxes < 10);
         m_user->waitForBox(false);
-        m_user->waitForRest(10);
     }
     m_user->click(DesktopUser::Main, "Cadrel Button");
     m_user->waitForBox(true);
