@@ -446,7 +446,9 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
         read.position = clock.samples(region.attribute("position").value());
         read.length = clock.samples(length);
     }
-    read.start = clock.samples(region.attribute("start").value());
+    const std::string_view start = region.attribute("start").value();
+    read.start = clock.samples(start);
+    read.isMusical = clock.hasUnits() && (SessionClock::isMusical(start) || length.find('b') != length.npos);
     const SessionId source = idIn(region.attribute("source-0").value()).value_or(-1);
     read.source = source;
     if (region.child("Extra")) {

@@ -47,6 +47,7 @@ struct ArdourSession {
         SessionId source = 0;
         std::optional<CutMark> head{}; ///< of an edge at which an earlier run has cut
         std::optional<CutMark> tail{};
+        bool isMusical = false; ///< one of its times was told in beats
     };
     struct List {
         TextRange text;
