@@ -687,6 +687,14 @@ void ArdourReader::placeMarkersOfTheUser(Project& project)
     }
 }
 
+bool ArdourReader::isOwn(const ArdourSession::Location& location, const Track& track, const Node& marker) const
+{
+    const SessionClock& clock = m_session.clock;
+    const bool isInPlace =
+        location.start == clock.samplesOf(marker.start()) && location.end == clock.samplesOf(marker.end());
+    return isInPlace || hasKind(textOf(location.name), track.name());
+}
+
 void ArdourReader::placeOwnMarkers(Project& project)
 {
     const std::vector<Node*> markers = OwnStorage::markersOf(project);
@@ -697,7 +705,8 @@ void ArdourReader::placeOwnMarkers(Project& project)
         const SessionId id = index < m_session.ownMarkers.size() ? m_session.ownMarkers[index] : 0;
         const auto found = m_session.locations.find(id);
         // One that was removed in Ardour is gone.
-        if (found == m_session.locations.end() || !m_ownLocations.insert(id).second)
+        if (found == m_session.locations.end() || !isOwn(found->second, track, *marker) ||
+            !m_ownLocations.insert(id).second)
             continue;
         const ArdourSession::Location& location = found->second;
         marker->setSpan(m_session.clock.secondsOf(location.start), m_session.clock.secondsOf(location.end));

@@ -808,6 +808,42 @@ TEST_F(OwnContent, FollowsWhatTheUserHasDoneToItInArdour)
     EXPECT_EQ(again.track("Insert").firstChild()->start(), 0.0);
 }
 
+TEST_F(OwnContent, IsKnownByItsKindOrByItsPlace)
+{
+    const std::string text = session.text();
+    // Name, start and end of the location; where it counts.
+    struct Case {
+        std::string location;
+        const char* track;
+    };
+    for (const Case& each : {Case{R"(name="mine" start="a282240000" end="a564480000")", "Insert"},
+                             Case{R"(name="INSERT 7" start="a0" end="a564480000")", "Insert"},
+                             Case{R"(name="mine" start="a282234120" end="a564480000")", "Markers"},
+                             Case{R"(name="mine" start="a282240000" end="a564485880")", "Markers"},
+                             Case{R"(name="Inser" start="a0" end="a564480000")", "Markers"}}) {
+        const std::string written = R"(name="Insert: new shot" start="a282240000" end="a564480000")";
+        std::string edited = text;
+        const std::size_t at = edited.find(written);
+        ASSERT_NE(at, std::string::npos);
+        edited.replace(at, written.size(), each.location);
+        const SessionProject again(edited);
+        const bool isOwn = std::string(each.track) == "Insert";
+        EXPECT_EQ(again.track("Insert").childCount(), isOwn ? 1U : 0U) << each.location;
+        EXPECT_EQ(again.track("Markers").childCount(), isOwn ? 1U : 2U) << each.location;
+    }
+}
+
+TEST_F(OwnContent, LeavesAMarkOfTheUserAloneThatTheListOfItsMarkersNames)
+{
+    std::string text = session.text();
+    const std::size_t list = text.find("markers=\"") + 9;
+    text.replace(list, text.find('"', list) - list, "64");
+    const SessionProject again(text);
+    EXPECT_EQ(again.track("Insert").childCount(), 0U);
+    // Its own counts as the user's, too, since nothing names it any more.
+    EXPECT_EQ(again.track("Markers").childCount(), 2U);
+}
+
 TEST_F(OwnContent, IsGoneWhenTheUserHasRemovedItInArdour)
 {
     std::string text = session.text();
