@@ -20,6 +20,7 @@
 namespace standin {
 class Application;
 class Project;
+class ProjectFileError;
 } // namespace standin
 
 namespace desktop {
@@ -85,6 +86,7 @@ public:
 private:
     friend class OpenDocuments;
     using Timer = std::function<Clock::time_point()>;
+    enum class Modules { Ask, LeaveAlone };
 
     /// Of work that was opened from an autosave.
     struct Recovery {
@@ -103,10 +105,18 @@ private:
     SaveAnswer saveAs(const std::filesystem::path& path);
     SaveAnswer write(const std::filesystem::path& path, const std::optional<cadrel::util::FileStamp>& expected);
     /// What there is to do while the user does nothing. Autosaves at most once in `interval`.
-    void idle(Clock::time_point now, Clock::duration interval);
+    void idle(Clock::time_point now, Clock::duration interval, Modules modules);
+    void look(Clock::time_point now, Modules modules);
+    /// Writes unsaved work that has no autosave yet, and lets others open the project. Nothing is thrown.
+    void leave(Modules modules);
+    /// Writes unsaved work under a name of its own, where there is any. Throws DocumentError.
+    void keepUnsavedAside();
     void retakeLock();
-    void autosave(Clock::time_point now);
+    void autosave(Clock::time_point now, Modules modules);
     void dropAutosave();
+    bool hasPresentAutosave() const { return m_autosavedVersion == m_mark.version(); }
+    /// Why the project couldn't be written, and what the user can do.
+    std::string failureOf(const std::filesystem::path& file, const standin::ProjectFileError& error);
     bool isWithinTransaction() const;
 
     std::uint64_t m_id;

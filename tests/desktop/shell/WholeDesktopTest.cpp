@@ -7,6 +7,7 @@
 #include "core/time/Framerate.h"
 #include "core/time/Timecode.h"
 #include "desktop/document/Autosave.h"
+#include "desktop/document/DocumentLock.h"
 #include "standin/Application.h"
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
@@ -389,6 +390,25 @@ TEST_P(WholeDesktopTest, OffersUnsavedWorkAfterItWasKilled)
     m_user->save();
     EXPECT_EQ(storedModel()->oldEdl().size(), 152U);
     EXPECT_FALSE(fs::exists(kept));
+}
+
+TEST_P(WholeDesktopTest, KeepsUnsavedWorkWhenTheSystemEndsIt)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->waitForTitle("there is unsaved work", [](const std::string& text) { return text.starts_with("*"); });
+    if (GetParam()) {
+        m_user->closeWindow();
+        m_user->waitForBox(true);
+    }
+    m_user->signalProgram(GetParam() ? SIGHUP : SIGTERM);
+    EXPECT_EQ(m_user->status(), -1);
+    EXPECT_TRUE(storedModel()->changeEdl().isEmpty());
+    EXPECT_FALSE(fs::exists(DocumentLock::pathFor(m_file)));
+
+    EXPECT_TRUE(recover());
+    EXPECT_EQ(storedModel()->changeEdl().size(), 60U);
 }
 
 // A few times; the variable CADREL_KILLS says how often else.
