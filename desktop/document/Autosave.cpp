@@ -182,12 +182,15 @@ void Autosave::remove(const fs::path& project)
         fs::remove(file, error);
 }
 
-void Autosave::keepAside(const fs::path& project)
+std::optional<fs::path> Autosave::keepAside(const fs::path& project)
 {
     const fs::path file = pathFor(project);
     std::error_code error;
-    if (isOurs(file))
-        fs::rename(file, asidePathFor(project), error);
+    if (!isOurs(file))
+        return std::nullopt;
+    const fs::path aside = asidePathFor(project);
+    fs::rename(file, aside, error);
+    return error ? std::nullopt : std::optional(aside);
 }
 
 fs::path Autosave::asidePathFor(const fs::path& project)

@@ -183,8 +183,11 @@ void OpenDocument::idle(Clock::time_point now, Clock::duration interval, Modules
         return;
     if (!m_mark.isSet())
         return dropAutosave();
-    const Clock::duration wait = std::max(interval, AutosaveShare * m_autosaveCost);
-    if (!hasPresentAutosave() && (!m_autosavedAt || now - *m_autosavedAt >= wait))
+    const auto isPast = [now](const std::optional<Clock::time_point>& time, Clock::duration wait) {
+        return !time || now - *time >= wait;
+    };
+    if (!hasPresentAutosave() && isPast(m_autosavedAt, interval) &&
+        isPast(m_autosaveTriedAt, AutosaveShare * m_autosaveCost))
         autosave(now, modules);
 }
 
@@ -220,17 +223,20 @@ void OpenDocument::retakeLock()
 {
     m_lock = DocumentLock(path());
     if (m_lock.isOurs())
-        Autosave::keepAside(path());
+        m_workOfOther = Autosave::keepAside(path());
 }
 
 void OpenDocument::autosave(Clock::time_point now, Modules modules)
 {
-    m_autosavedAt = now;
+    m_autosaveTriedAt = now;
     const auto start = m_timer();
     try {
         const std::string text = modules == Modules::Ask ? m_mark.takeText() : m_mark.takeTextAsItIs();
-        if (!m_mark.isSet())
+        if (!m_mark.isSet()) {
+            m_autosaveCost = m_timer() - start;
             return dropAutosave();
+        }
+        m_autosavedAt = now;
         const std::uint64_t version = m_mark.version();
         Autosave::write(path(), m_formerBasis.value_or(m_file.print()), text, std::chrono::system_clock::now());
         // What couldn't be written is tried again after the interval.

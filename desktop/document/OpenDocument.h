@@ -15,6 +15,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace standin {
@@ -73,6 +74,8 @@ public:
     StoredFile::State fileState() { return m_file.look(); }
     /// Why the last autosave couldn't be written, in one line; empty as long as they can.
     const std::string& autosaveFault() const { return m_autosaveFault; }
+    /// Where the unsaved work of another program is, which had the project open as well and has ended; answered once.
+    std::optional<std::filesystem::path> takeWorkOfOther() { return std::exchange(m_workOfOther, std::nullopt); }
 
     // The undo list, the oldest entry first.
 
@@ -129,10 +132,12 @@ private:
     Timer m_timer;
     std::optional<Clock::time_point> m_lookedAt;
     Clock::duration m_lookCost{};
-    std::optional<Clock::time_point> m_autosavedAt;
+    std::optional<Clock::time_point> m_autosaveTriedAt;
+    std::optional<Clock::time_point> m_autosavedAt; ///< when there was something to write last
     Clock::duration m_autosaveCost{};
     std::optional<std::uint64_t> m_autosavedVersion; ///< nothing where there is no autosave of ours
     std::string m_autosaveFault;
+    std::optional<std::filesystem::path> m_workOfOther;
 };
 
 } // namespace desktop

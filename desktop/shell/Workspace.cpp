@@ -231,7 +231,10 @@ bool Workspace::isReloadWanted(const OpenDocument& document)
 void Workspace::lookAtAutosaves()
 {
     for (std::size_t index = 0; index < m_documents.size(); ++index) {
-        const OpenDocument& document = m_documents.at(index);
+        OpenDocument& document = m_documents.at(index);
+        if (const auto work = document.takeWorkOfOther())
+            return tell("Another program has ended without saving " + quotedName(document.path()) +
+                        ". Its work is kept in the file " + quotedName(*work) + ".");
         const std::string& fault = document.autosaveFault();
         if (fault.empty() || !document.isUnsaved() || !m_toldFaults.try_emplace(document.id(), fault).second)
             continue;

@@ -42,7 +42,7 @@ public:
     /// Looks whether another program has changed the active project's file, and tells each change once.
     void lookAtFile();
 
-    /// Tells once that unsaved work of a project has no autosave, and why.
+    /// Tells once that unsaved work of a project has no autosave, and why; and where that of another program is.
     void lookAtAutosaves();
 
     void tell(const std::string& message);

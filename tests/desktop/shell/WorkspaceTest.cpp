@@ -8,8 +8,10 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <cstdint>
 #include <filesystem>
+#include <memory>
 #include <stdexcept>
 #include <string>
 
@@ -377,6 +379,27 @@ TEST_F(WorkspaceTest, TellsOnceThatUnsavedWorkHasNoAutosave)
         EXPECT_EQ(boxes.messages.size(), 1U);
         EXPECT_NE(lastMessage().find("reel.stage.autosave: is in the way"), std::string::npos) << lastMessage();
     }
+}
+
+TEST_F(WorkspaceTest, TellsOnceWhereTheWorkOfAnotherProgramIsThatHasEnded)
+{
+    const fs::path file = fs::canonical(writeProject("reel.stage"));
+    auto lock = std::make_unique<DocumentLock>(file);
+    boxes.answers = {u"Open All the Same"};
+    ASSERT_TRUE(workspace.open(file));
+    Autosave::write(file, ContentPrint::of(contentOf(file)), "its work", std::chrono::system_clock::now());
+    const std::size_t asked = boxes.messages.size();
+    idle();
+    workspace.lookAtAutosaves();
+    EXPECT_EQ(boxes.messages.size(), asked) << "It still works.";
+
+    lock.reset();
+    idle();
+    workspace.lookAtAutosaves();
+    workspace.lookAtAutosaves();
+    EXPECT_EQ(boxes.messages.size(), asked + 1);
+    EXPECT_NE(lastMessage().find("\"reel.stage.autosave-1\""), std::string::npos) << lastMessage();
+    EXPECT_TRUE(fs::exists(folder / "reel.stage.autosave-1"));
 }
 
 TEST_F(WorkspaceTest, SaysThatAFileIsNoVideo)
