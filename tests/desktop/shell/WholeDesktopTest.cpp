@@ -416,7 +416,7 @@ TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyM
 {
     constexpr int Longest = 5000;
     const char* const wanted = std::getenv("CADREL_KILLS");
-    const int count = wanted ? std::atoi(wanted) : 2;
+    const int count = wanted ? std::atoi(wanted) : 4;
     std::mt19937 random(GetParam() ? 2 : 1);
     int offered = 0;
     for (int trial = 0; trial < count; ++trial) {
