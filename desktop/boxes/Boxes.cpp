@@ -74,6 +74,7 @@ bool Boxes::showProgress(const Progress& progress)
     } else if (now - m_progressServed < ProgressInterval)
         return m_progress->isCancelled();
     m_progress->update(progress);
+    keepKeyboard();
     m_loop.turnWithoutWaiting();
     m_progressServed = Clock::now();
     return m_progress->isCancelled();
@@ -112,8 +113,20 @@ void Boxes::hide(Box& box)
 void Boxes::run(Box& box)
 {
     show(box);
-    m_loop.runUntil([&] { return box.isDone(); });
+    m_loop.runUntil([&] {
+        keepKeyboard();
+        return box.isDone();
+    });
     hide(box);
+}
+
+/// A window that gets the keyboard from another one gives it to what had it before, or to nothing, even if a box has come up since.
+void Boxes::keepKeyboard()
+{
+    juce::Component* const focused = juce::Component::getCurrentlyFocusedComponent();
+    const juce::ComponentPeer* const peer = m_window.getPeer();
+    if (focused ? m_window.isParentOf(focused) : peer && peer->isFocused())
+        m_open.back()->keepFocus(focused);
 }
 
 } // namespace desktop

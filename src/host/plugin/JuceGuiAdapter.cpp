@@ -57,6 +57,7 @@ JuceGuiAdapter::JuceGuiAdapter(std::unique_ptr<juce::Component> content, IHostCo
     setSize(MinimumWidth, MinimumHeight);
     addAndMakeVisible(*m_content, -1);
     layOutContent();
+    addMouseListener(this, true);
 }
 
 JuceGuiAdapter::~JuceGuiAdapter()
@@ -134,13 +135,15 @@ int32 JuceGuiAdapter::idle()
 {
     // A host may give the view back in the midst of it.
     const auto self = Counted<JuceGuiAdapter>::share(this);
-    return resultOf([&] {
+    const util::Result::Type result = resultOf([&] {
         if (m_unusedKeys)
             m_unusedKeys->beginServing();
         // The view may be removed meanwhile.
         if (serve() && m_unusedKeys)
             m_unusedKeys->endServing();
     });
+    endPassingOver();
+    return result;
 }
 
 int32 JuceGuiAdapter::onWheel(float distance)
@@ -272,6 +275,33 @@ bool JuceGuiAdapter::keyPressed(const juce::KeyPress& key)
     if (!key.isKeyCode(juce::KeyPress::tabKey) && !m_keyIsFromHost && m_unusedKeys)
         m_unusedKeys->sendOn(key.getKeyCode(), key.getTextCharacter());
     return false;
+}
+
+void JuceGuiAdapter::focusOfChildComponentChanged(FocusChangeType /*cause*/)
+{
+    if (!hasKeyboardFocus(true))
+        m_hasLostKeyboard = true;
+}
+
+void JuceGuiAdapter::mouseDown(const juce::MouseEvent& /*event*/)
+{
+    juce::ComponentPeer* const peer = getPeer();
+    if (!std::exchange(m_hasLostKeyboard, false) || !peer || !hasKeyboardFocus(true))
+        return;
+    // A window manager may take the keyboard away just before a click. The click gets it back, and JUCE hears of that afterwards.
+    // It would then hand the keyboard to the component that had it before.
+    juce::Component* const former = peer->getLastFocusedSubcomponent();
+    if (former == this || former == getCurrentlyFocusedComponent() || !former->getWantsKeyboardFocus())
+        return;
+    former->setWantsKeyboardFocus(false);
+    m_passedOver = former;
+}
+
+void JuceGuiAdapter::endPassingOver()
+{
+    if (m_passedOver)
+        m_passedOver->setWantsKeyboardFocus(true);
+    m_passedOver = nullptr;
 }
 
 bool JuceGuiAdapter::invokeEditAction(const char* action)

@@ -62,6 +62,9 @@ public:
     /// What no component has used: undo and redo are the host's actions, Tab moves the keyboard, and the rest goes on to the
     /// host's window.
     bool keyPressed(const juce::KeyPress& key) override;
+    /// Of the content's components, too.
+    void mouseDown(const juce::MouseEvent& event) override;
+    void focusOfChildComponentChanged(FocusChangeType cause) override;
 
 private:
     static double scale();
@@ -72,6 +75,7 @@ private:
     void askForSize();
     void leaveDesktop() noexcept;
     void layOutContent();
+    void endPassingOver();
     bool invokeEditAction(const char* action);
 
     std::unique_ptr<juce::Component> m_content; ///< null after its end
@@ -79,7 +83,9 @@ private:
     Velmark::Counted<Velmark::FObject> m_engine;
     std::optional<UnusedKeys> m_unusedKeys; ///< while it is attached
     bool m_isLayingOut = false;
-    bool m_keyIsFromHost = false; ///< so it needn't be sent back
+    bool m_keyIsFromHost = false;                               ///< so it needn't be sent back
+    bool m_hasLostKeyboard = false;                             ///< since the last click
+    juce::Component::SafePointer<juce::Component> m_passedOver; ///< doesn't get the keyboard until JUCE has been served
 };
 
 } // namespace cadrel::host

@@ -116,6 +116,45 @@ TEST_F(BoxesTest, LetNothingBeneathThemTakeInput)
     EXPECT_EQ(m_clicks, 1) << "Afterwards it does again.";
 }
 
+TEST_F(BoxesTest, LeaveTheKeyboardToTheButtonThatHasItAfterAClickBesideThem)
+{
+    const auto focused = [] { return juce::Component::getCurrentlyFocusedComponent(); };
+    const juce::Component* second = nullptr;
+    will([&] {
+        focused()->moveKeyboardFocusToSibling(true);
+        second = focused();
+    });
+    willClickOnTheDesk();
+    will([] {});
+    will([&] { EXPECT_EQ(focused(), second); });
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Remove", u"Cancel"}), 1U);
+}
+
+TEST_F(BoxesTest, TakeTheKeyboardFromWhatLiesBeneathThem)
+{
+    m_button.grabKeyboardFocus();
+    // The window loses the keyboard; meanwhile a box comes up; then the window gets it back.
+    m_window.getPeer()->handleFocusLoss();
+    will([this] {
+        m_window.getPeer()->handleFocusGain();
+        EXPECT_TRUE(m_button.hasKeyboardFocus(true)) << "JUCE does so.";
+    });
+    will([] {});
+    will([this] { EXPECT_FALSE(m_button.hasKeyboardFocus(true)); });
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Cancel"}), 0U);
+}
+
+TEST_F(BoxesTest, TakeTheKeyboardThatNothingInTheWindowHas)
+{
+    will([] { juce::Component::unfocusAllComponents(); });
+    will([] {});
+    will([] { EXPECT_TRUE(juce::Component::getCurrentlyFocusedComponent()); });
+    willPress(juce::KeyPress::escapeKey);
+    EXPECT_EQ(m_boxes.ask(u"Start?", {u"Keep", u"Cancel"}), 1U);
+}
+
 TEST_F(BoxesTest, TellTheIdleWorkWhetherItIsCalledFromWithinAnother)
 {
     will([this] {

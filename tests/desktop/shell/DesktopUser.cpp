@@ -176,6 +176,23 @@ void DesktopUser::click(const std::string& sheet, const std::string& name, const
     clickAt(m_places.at(sheet, name, text));
 }
 
+void DesktopUser::doubleClick(const std::string& sheet, const std::string& name, std::chrono::milliseconds pause)
+{
+    const Pixel middle = middleOf(m_places.at(sheet, name));
+    m_user.moveTo(middle.x, middle.y);
+    m_user.click();
+    std::this_thread::sleep_for(pause);
+    m_user.click();
+}
+
+void DesktopUser::clickBesideTheBox()
+{
+    constexpr int Inside = 20;
+    const Pixel origin = originOf(m_window);
+    m_user.moveTo(origin.x + Inside, origin.y + ShellLayout::of(Height, -1).tracksTop + TracksHeight / 2);
+    m_user.click();
+}
+
 void DesktopUser::clickChangeEvent(int row)
 {
     const WindowPlaces::Place first = m_places.at(Main, "Change Table List Box Row");

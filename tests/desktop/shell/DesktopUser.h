@@ -6,6 +6,7 @@
 #include "tests/support/x11/XUser.h"
 #include "tests/support/x11/XWindows.h"
 
+#include <chrono>
 #include <filesystem>
 #include <functional>
 #include <string>
@@ -36,6 +37,9 @@ public:
 
     /// In the middle of a control of Cadrel's, named as in WindowPlaces.
     void click(const std::string& sheet, const std::string& name, const std::string& text = "");
+    void doubleClick(const std::string& sheet, const std::string& name, std::chrono::milliseconds pause);
+    /// On the tracks at their left edge, over which a box lies, but not its panel.
+    void clickBesideTheBox();
     /// On an event of the change list, counted from 0.
     void clickChangeEvent(int row);
     /// In the second row of the videos, below the title of a column.

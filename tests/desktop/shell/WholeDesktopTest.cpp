@@ -3,11 +3,13 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/model/DataModel.h"
+#include "core/model/ListOfKind.h"
 #include "core/settings/Settings.h"
 #include "core/time/Framerate.h"
 #include "core/time/Timecode.h"
 #include "desktop/document/Autosave.h"
 #include "desktop/document/DocumentLock.h"
+#include "gui/table/StoredTable.h"
 #include "standin/Application.h"
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
@@ -181,6 +183,16 @@ protected:
         archive >> *model;
         return model;
     }
+    /// The rows of the change list that are selected in the file.
+    std::vector<int> selectedChangeEvents()
+    {
+        const auto model = storedModel();
+        std::vector<int> rows;
+        cadrel::gui::StoredTable(*model, core::ListKind::Change)
+            .selection(static_cast<int>(model->changeEdl().size()))
+            .forEach([&](int row) { rows.push_back(row); });
+        return rows;
+    }
     /// Whether a take of the clip begins there on the first dialogue track of the file, in seconds of the project.
     bool hasClipAt(double start)
     {
@@ -335,6 +347,50 @@ TEST_P(WholeDesktopTest, ConformsAReelByMouseAndKeysAndOpensItAgain)
     m_user->waitForTitle("nothing is unsaved", [](const std::string& text) { return text == "reel3.stage - Cadrel"; });
     m_user->closeWindow();
     EXPECT_EQ(m_user->status(), 0) << "Nothing was changed, so that nothing is asked.";
+    EXPECT_TRUE(isConformed());
+}
+
+TEST_P(WholeDesktopTest, GivesTheKeysToTheTableThatIsClickedAfterABoxWasOpen)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->save();
+    m_user->clickChangeEvent(2);
+    m_user->waitForRest(20); // or the window manager hasn't dealt with the click yet
+    m_user->press(XK_Down);
+    m_user->press(XK_Down);
+    m_user->save();
+    EXPECT_EQ(selectedChangeEvents(), std::vector<int>{4});
+}
+
+TEST_P(WholeDesktopTest, GivesTheKeysToAQuestionHoweverItWasClickedFor)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->save();
+    int boxes = 0;
+    for (const int pause : {0, 30, 90, 200}) {
+        SCOPED_TRACE(testing::Message() << pause << " ms between the clicks");
+        m_user->doubleClick(DesktopUser::Main, "Cadrel Button", std::chrono::milliseconds(pause));
+        m_user->waitForBox(true);
+        // The second click may have asked for another one.
+        do {
+            m_user->waitForRest(10);
+            m_user->press(XK_Escape);
+            m_user->waitForRest(10);
+        } while (m_user->isBoxOpen() && ++boxes < 10);
+        m_user->waitForBox(false);
+    }
+    m_user->click(DesktopUser::Main, "Cadrel Button");
+    m_user->waitForBox(true);
+    m_user->waitForRest(10);
+    m_user->clickBesideTheBox();
+    m_user->waitForRest(10);
+    m_user->press(XK_Return); // Keep
+    m_user->waitForBox(false);
+    m_user->save();
     EXPECT_TRUE(isConformed());
 }
 

@@ -574,6 +574,27 @@ TEST_F(JuceGuiAdapterTest, TakesTheKeyboardBackThatItHasLostSinceItLastLooked)
     EXPECT_TRUE(turnUntil([this] { return has("key A"); }));
 }
 
+// Window managers do so with a click: first their window gets the keyboard, and then the click comes.
+TEST_F(JuceGuiAdapterTest, GivesTheKeyboardToWhatIsClickedRightAfterTheHostHasTakenIt)
+{
+    start();
+    m_user->moveTo(100, 52);
+    m_user->click();
+    ASSERT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
+
+    for (juce::TextEditor* const clicked : {&m_content->second, &m_content->field}) {
+        m_user->setFocus(reinterpret_cast<std::uintptr_t>(m_window->native()->parent()));
+        m_user->moveTo(100, clicked == &m_content->second ? 82 : 52);
+        m_user->click();
+        ASSERT_TRUE(turnUntil([&] { return clicked->hasKeyboardFocus(true); }));
+        turn(5);
+        m_user->press('b');
+        EXPECT_TRUE(turnUntil([&] { return clicked->getText() == "b"; }));
+    }
+    m_user->press(XK_Tab);
+    EXPECT_TRUE(turnUntil([this] { return m_content->second.hasKeyboardFocus(true); })) << "It can still be reached.";
+}
+
 TEST_F(JuceGuiAdapterTest, FollowsTheSizeOfTheHost)
 {
     start();
