@@ -81,13 +81,16 @@ void DesktopProgram::run(const std::vector<fs::path>& projects)
 void DesktopProgram::idle(bool isWaiting)
 {
     // While something waits for the user, the host isn't idle, but views of modules go on working.
-    if (isWaiting || m_boxes.isOpen()) {
+    const bool isHostIdle = !isWaiting && !m_boxes.isOpen();
+    endIfAsked(isHostIdle);
+    const auto now = std::chrono::steady_clock::now();
+    if (!isHostIdle) {
         m_application.views().idle();
+        m_documents.idleBeneathBox(now);
         return;
     }
-    doActs();
+    m_acts.run([this](const std::string& fault) { m_workspace.tell(fault); });
     m_application.idle();
-    const auto now = std::chrono::steady_clock::now();
     m_documents.idle(now);
     if (now >= m_nextLook) {
         m_workspace.lookAtFile();
@@ -98,11 +101,13 @@ void DesktopProgram::idle(bool isWaiting)
     refreshTracks();
 }
 
-void DesktopProgram::doActs()
+void DesktopProgram::endIfAsked(bool isHostIdle)
 {
-    // What comes meanwhile is done in the next idle time.
-    for (const auto& act : std::exchange(m_acts, {}))
-        act();
+    const int signal = EndSignals::received();
+    if (signal == 0)
+        return;
+    m_documents.leave(isHostIdle);
+    EndSignals::endBy(signal);
 }
 
 void DesktopProgram::choose(int command)

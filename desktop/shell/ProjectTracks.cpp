@@ -12,6 +12,13 @@ namespace desktop {
 
 using namespace Velmark;
 
+namespace {
+
+/// Reading a long list anew for each key would hold the user up: it may take one part in so many of the time.
+constexpr int LookShare = 20;
+
+} // namespace
+
 /// Tells the view that the project has changed.
 class ProjectTracks::Dependent : public Implements<Dependent, FObject> {
 public:
@@ -44,7 +51,13 @@ ProjectTracks::~ProjectTracks()
 
 void ProjectTracks::idle()
 {
-    if (!m_change.look(*m_project))
+    const auto start = Clock::now();
+    if (start < m_nextLook)
+        return;
+    const bool isNew = m_change.look(*m_project);
+    const auto end = Clock::now();
+    m_nextLook = end + LookShare * (end - start);
+    if (!isNew)
         return;
     m_view->setChange(m_change.map());
     m_view->showEvent(m_change.event());

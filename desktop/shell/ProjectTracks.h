@@ -8,6 +8,7 @@
 #include "velmark/Counted.h"
 #include "velmark/FObject.h"
 
+#include <chrono>
 #include <memory>
 
 namespace standin {
@@ -33,12 +34,14 @@ public:
 
 private:
     class Dependent;
+    using Clock = std::chrono::steady_clock;
 
     standin::Application& m_application;
     Velmark::Counted<standin::Project> m_project;
     std::unique_ptr<TracksView> m_view;
     Velmark::Counted<Dependent> m_dependent;
     StoredChange m_change;
+    Clock::time_point m_nextLook{};
 };
 
 } // namespace desktop

@@ -14,6 +14,9 @@
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
+#include <fstream>
+#include <iterator>
+#include <sstream>
 #include <stdexcept>
 #include <thread>
 #include <utility>
@@ -318,6 +321,27 @@ bool DesktopUser::isRunning()
 void DesktopUser::killProgram() const
 {
     kill(m_process, SIGKILL);
+}
+
+void DesktopUser::signalProgram(int signal) const
+{
+    kill(m_process, signal);
+}
+
+double DesktopUser::processorSeconds() const
+{
+    std::ifstream file("/proc/" + std::to_string(m_process) + "/stat");
+    std::string text((std::istreambuf_iterator<char>(file)), {});
+    // The name stands in parentheses and may hold blanks; the time of the program and of the system for it are the 12th and
+    // 13th after it.
+    std::istringstream fields(text.substr(text.rfind(')') + 1));
+    std::string passedOver;
+    for (int field = 0; field < 11; ++field)
+        fields >> passedOver;
+    double own = 0.0;
+    double system = 0.0;
+    fields >> own >> system;
+    return (own + system) / static_cast<double>(sysconf(_SC_CLK_TCK));
 }
 
 int DesktopUser::status()

@@ -20,7 +20,7 @@ namespace desktop::tests {
 
 /// The desktop program in a process of its own, and a user in front of it with mouse and keyboard. The window gets a size in which
 /// Cadrel's has its smallest one, so that its controls stand where WindowPlaces says. Everything that doesn't come about within
-/// ten seconds, or before the program ends, throws std::runtime_error.
+/// thirty seconds, or before the program ends, throws std::runtime_error.
 class DesktopUser {
 public:
     static constexpr const char* Main = "";
@@ -73,7 +73,11 @@ public:
     void save();
     /// At once, from any thread.
     void killProgram() const;
-    /// Waits for the end of the program and answers its exit status.
+    /// As the system does when the user logs out.
+    void signalProgram(int signal) const;
+    /// The time of the processors that the program has taken so far, in seconds.
+    double processorSeconds() const;
+    /// Waits for the end of the program and answers its exit status; -1 where a signal has ended it.
     int status();
     bool isRunning();
 

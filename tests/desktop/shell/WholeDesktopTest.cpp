@@ -8,6 +8,7 @@
 #include "core/time/Framerate.h"
 #include "core/time/Timecode.h"
 #include "desktop/document/Autosave.h"
+#include "desktop/document/DocumentLock.h"
 #include "gui/table/StoredTable.h"
 #include "standin/Application.h"
 #include "standin/project/Project.h"
@@ -447,12 +448,31 @@ TEST_P(WholeDesktopTest, OffersUnsavedWorkAfterItWasKilled)
     EXPECT_FALSE(fs::exists(kept));
 }
 
+TEST_P(WholeDesktopTest, KeepsUnsavedWorkWhenTheSystemEndsIt)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->waitForTitle("there is unsaved work", [](const std::string& text) { return text.starts_with("*"); });
+    if (GetParam()) {
+        m_user->closeWindow();
+        m_user->waitForBox(true);
+    }
+    m_user->signalProgram(GetParam() ? SIGHUP : SIGTERM);
+    EXPECT_EQ(m_user->status(), -1);
+    EXPECT_TRUE(storedModel()->changeEdl().isEmpty());
+    EXPECT_FALSE(fs::exists(DocumentLock::pathFor(m_file)));
+
+    EXPECT_TRUE(recover());
+    EXPECT_EQ(storedModel()->changeEdl().size(), 60U);
+}
+
 // A few times; the variable CADREL_KILLS says how often else.
 TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyMoment)
 {
     constexpr int Longest = 5000;
     const char* const wanted = std::getenv("CADREL_KILLS");
-    const int count = wanted ? std::atoi(wanted) : 2;
+    const int count = wanted ? std::atoi(wanted) : 4;
     std::mt19937 random(GetParam() ? 2 : 1);
     int offered = 0;
     for (int trial = 0; trial < count; ++trial) {
