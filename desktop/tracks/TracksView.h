@@ -72,8 +72,8 @@ public:
     /// Whether outlines show where each clip stood before.
     void setGhosts(bool shown);
     bool showsGhosts() const { return m_showsGhosts; }
-    /// Scrolls to the place of an event of the change EDL and marks the clips that it moves; nothing unmarks them.
-    void showEvent(std::optional<std::size_t> event);
+    /// Marks the clips that an event of the change EDL moves, and scrolls to its place if wanted; nothing unmarks them.
+    void showEvent(std::optional<std::size_t> event, bool scrolls = true);
 
     /// The user has clicked on a clip: the index of the event in the change EDL that moves it or has moved it.
     std::function<void(std::size_t event)> onClipClicked;
