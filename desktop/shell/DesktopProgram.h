@@ -7,6 +7,7 @@
 #include "desktop/document/OpenDocuments.h"
 #include "desktop/document/RecentFiles.h"
 #include "desktop/shell/MainWindow.h"
+#include "desktop/shell/MissingFiles.h"
 #include "desktop/shell/ModulePlaces.h"
 #include "desktop/shell/ProjectTracks.h"
 #include "desktop/shell/Workspace.h"
@@ -63,6 +64,7 @@ private:
     TracksView* tracks();
     std::vector<standin::MenuRegistry::Command> moduleCommands();
     MenuState menuState();
+    std::vector<MenuState::Recent> recentFiles();
 
     EventLoop m_loop;
     standin::Videos m_videos;
@@ -71,6 +73,8 @@ private:
     standin::Application m_application;
     std::optional<standin::ModuleLoader> m_module;
     RecentFiles m_recent;
+    std::vector<std::filesystem::path> m_listedRecent; ///< in the menu
+    MissingFiles m_missingRecent;
     OpenDocuments m_documents;
     Workspace m_workspace;
     FrameStills m_stills;

@@ -86,6 +86,8 @@ public:
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;
+    void visibilityChanged() override { followWindow(); }
+    void parentHierarchyChanged() override { followWindow(); }
     bool keyPressed(const juce::KeyPress& key) override;
     void mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel) override;
 
@@ -130,6 +132,8 @@ private:
     int viewWidth() const;
     void scrollBarMoved(juce::ScrollBar* bar, double start) override;
     void timerCallback() override;
+    /// Nothing is polled for a view that isn't in the window, such as that of another tab.
+    void followWindow();
     Times times() const;
 
     juce::SharedResourcePointer<cadrel::gui::LookAndFeel> m_look;
