@@ -51,6 +51,7 @@ DesktopProgram::DesktopProgram(const ModulePlaces& places)
     m_application.views().setWindowSystem(&view.embedded());
     m_loop.setIdle([this](bool isWaiting) { idle(isWaiting); });
     loadModule(places);
+    m_missingRecent.look(m_recent.paths());
 }
 
 DesktopProgram::~DesktopProgram()
@@ -128,6 +129,9 @@ void DesktopProgram::choose(int command)
         return invoke(IActionManager::Undo);
     case MenuCommand::Redo:
         return invoke(IActionManager::Redo);
+    case MenuCommand::ClearRecent:
+        m_recent.clear();
+        return;
     case MenuCommand::Keys:
         return showKeys();
     case MenuCommand::About:
@@ -179,9 +183,8 @@ void DesktopProgram::chooseModuleCommand(std::size_t index)
 
 void DesktopProgram::openRecent(std::size_t index)
 {
-    const auto entries = m_recent.entries();
-    if (index < entries.size())
-        open({entries[index].path});
+    if (index < m_listedRecent.size() && m_workspace.openRecent(m_recent, fs::path(m_listedRecent[index])))
+        showModuleWindow();
 }
 
 void DesktopProgram::takeDropped(const std::vector<fs::path>& files, juce::Point<int> place)
@@ -305,13 +308,23 @@ std::vector<standin::MenuRegistry::Command> DesktopProgram::moduleCommands()
     return commands;
 }
 
+std::vector<MenuState::Recent> DesktopProgram::recentFiles()
+{
+    m_listedRecent = m_recent.paths();
+    std::vector<MenuState::Recent> files;
+    for (const fs::path& path : m_listedRecent)
+        files.push_back({path.string(), m_missingRecent.isMissing(path)});
+    // For the next time that the menu is opened.
+    m_missingRecent.look(m_listedRecent);
+    return files;
+}
+
 MenuState DesktopProgram::menuState()
 {
     MenuState state;
     for (const auto& command : moduleCommands())
         state.moduleCommands.push_back(command.title);
-    for (const RecentFiles::Entry& entry : m_recent.entries())
-        state.recentFiles.push_back(entry.path.string());
+    state.recentFiles = recentFiles();
     if (const OpenDocument* const active = m_documents.active()) {
         state.hasProject = true;
         state.undoNames = active->undoNames();

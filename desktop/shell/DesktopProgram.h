@@ -9,6 +9,7 @@
 #include "desktop/shell/ActQueue.h"
 #include "desktop/shell/EndSignals.h"
 #include "desktop/shell/MainWindow.h"
+#include "desktop/shell/MissingFiles.h"
 #include "desktop/shell/ModulePlaces.h"
 #include "desktop/shell/ProjectTracks.h"
 #include "desktop/shell/Workspace.h"
@@ -65,6 +66,7 @@ private:
     TracksView* tracks();
     std::vector<standin::MenuRegistry::Command> moduleCommands();
     MenuState menuState();
+    std::vector<MenuState::Recent> recentFiles();
 
     EndSignals m_endSignals;
     EventLoop m_loop;
@@ -74,6 +76,8 @@ private:
     standin::Application m_application;
     std::optional<standin::ModuleLoader> m_module;
     RecentFiles m_recent;
+    std::vector<std::filesystem::path> m_listedRecent; ///< in the menu
+    MissingFiles m_missingRecent;
     OpenDocuments m_documents;
     Workspace m_workspace;
     FrameStills m_stills;

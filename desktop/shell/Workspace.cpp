@@ -10,6 +10,7 @@
 
 #include <algorithm>
 #include <ctime>
+#include <system_error>
 #include <utility>
 #include <vector>
 
@@ -61,6 +62,18 @@ void Workspace::chooseAndOpen()
     for (const std::u16string& file :
          m_boxes.chooseFiles({u"Open Project", {StageFilter, ArdourFilter}, folder, false}))
         open(toUtf8(file));
+}
+
+bool Workspace::openRecent(RecentFiles& recent, const fs::path& path)
+{
+    enum { Remove, Cancel };
+    std::error_code ignored;
+    if (fs::exists(path, ignored))
+        return open(path);
+    if (ask(quotedName(path) + " isn't there.\n\n" + path.string(), {u"Take It off the List", u"Cancel"}, Cancel) ==
+        Remove)
+        recent.remove(path);
+    return false;
 }
 
 bool Workspace::open(const fs::path& path)

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "desktop/document/OpenDocuments.h"
+#include "desktop/document/RecentFiles.h"
 #include "standin/services/UserBoxes.h"
 
 #include <cstdint>
@@ -24,6 +25,8 @@ public:
     void chooseAndOpen();
     /// False when it wasn't opened, after the user has been told why or has said so himself.
     bool open(const std::filesystem::path& path);
+    /// Opens a project of the list of recent ones. One that isn't there is taken off the list if the user wants that.
+    bool openRecent(RecentFiles& recent, const std::filesystem::path& path);
     /// False when it isn't saved, after the user has been told why or has said so himself.
     bool save(OpenDocument& document);
     bool saveAs(OpenDocument& document);

@@ -3,6 +3,11 @@
 #include "tests/desktop/shell/DesktopUser.h"
 
 #include "desktop/shell/ShellLayout.h"
+#include "desktop/tracks/RowLayout.h"
+#include "desktop/tracks/TimeRuler.h"
+#include "desktop/tracks/TimeScale.h"
+#include "desktop/tracks/TrackHeaders.h"
+#include "desktop/tracks/TrackIndex.h"
 #include "tests/module/MainStills.h"
 #include "tests/support/TreePaths.h"
 #include "tests/support/x11/XDrag.h"
@@ -191,6 +196,32 @@ void DesktopUser::clickBesideTheBox()
     const Pixel origin = originOf(m_window);
     m_user.moveTo(origin.x + Inside, origin.y + ShellLayout::of(Height, -1).tracksTop + TracksHeight / 2);
     m_user.click();
+}
+
+DesktopUser::Pixel DesktopUser::trackPixel(const standin::Project& project, std::size_t row, double seconds) const
+{
+    constexpr int ScrollBar = 12;
+    constexpr int IntoTheRow = 6;
+    const TrackIndex index(project);
+    const RowLayout rows(index.rows(), RowLayout::Size::Medium);
+    TimeScale scale;
+    scale.fit(index.programme()->start, index.programme()->end, Width - TrackHeaders::Width - ScrollBar);
+    const Pixel origin = originOf(m_window);
+    return {origin.x + TrackHeaders::Width + static_cast<int>(scale.pixelAt(seconds)),
+            origin.y + ShellLayout::of(Height, -1).tracksTop + TimeRuler::Height + rows.top(row) + IntoTheRow};
+}
+
+void DesktopUser::clickTrack(const standin::Project& project, std::size_t row, double seconds)
+{
+    const Pixel place = trackPixel(project, row, seconds);
+    m_user.moveTo(place.x, place.y);
+    m_user.click();
+}
+
+unsigned long DesktopUser::trackColour(const standin::Project& project, std::size_t row, double seconds) const
+{
+    const Pixel place = trackPixel(project, row, seconds);
+    return m_windows.colourAt(place.x, place.y);
 }
 
 void DesktopUser::clickChangeEvent(int row)

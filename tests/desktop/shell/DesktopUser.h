@@ -16,6 +16,10 @@
 
 struct _XDisplay;
 
+namespace standin {
+class Project;
+} // namespace standin
+
 namespace desktop::tests {
 
 /// The desktop program in a process of its own, and a user in front of it with mouse and keyboard. The window gets a size in which
@@ -40,6 +44,10 @@ public:
     void doubleClick(const std::string& sheet, const std::string& name, std::chrono::milliseconds pause);
     /// On the tracks at their left edge, over which a box lies, but not its panel.
     void clickBesideTheBox();
+    /// At a place of the tracks of which all is shown, in the row with that index; in seconds of the project.
+    void clickTrack(const standin::Project& project, std::size_t row, double seconds);
+    /// What stands there in the band with the names of clips, as 0xRRGGBB.
+    unsigned long trackColour(const standin::Project& project, std::size_t row, double seconds) const;
     /// On an event of the change list, counted from 0.
     void clickChangeEvent(int row);
     /// In the second row of the videos, below the title of a column.
@@ -90,6 +98,7 @@ private:
         int y;
     };
     Pixel originOf(unsigned long window) const;
+    Pixel trackPixel(const standin::Project& project, std::size_t row, double seconds) const;
     Pixel middleOf(const cadrel::tests::WindowPlaces::Place& place) const;
     void clickAt(const cadrel::tests::WindowPlaces::Place& place);
 

@@ -9,6 +9,8 @@
 #include "core/time/Timecode.h"
 #include "desktop/document/Autosave.h"
 #include "desktop/document/DocumentLock.h"
+#include "desktop/tracks/TrackIndex.h"
+#include "gui/look/Palette.h"
 #include "gui/table/StoredTable.h"
 #include "standin/Application.h"
 #include "standin/project/Project.h"
@@ -62,6 +64,8 @@ constexpr double NewStart = 64.0 + 21.0 / 24.0;
 /// Its copy in the preview.
 constexpr double PreviewStart = 24.0 * 60.0 * 60.0 + NewStart;
 constexpr double SameInstant = 1.0 / 384000;
+/// The name of a clip that the selected event moves.
+constexpr unsigned long Marked = cadrel::gui::Palette::selection.argb & 0xffffffUL;
 
 /// The four of each event, in the order of the list.
 std::vector<std::string> timecodesOf(const core::EventList& list)
@@ -192,6 +196,26 @@ protected:
             .selection(static_cast<int>(model->changeEdl().size()))
             .forEach([&](int row) { rows.push_back(row); });
         return rows;
+    }
+    /// Selects another event, saves, and clicks into the clip that begins there on the first dialogue track; and saves again, when
+    /// the clip is marked.
+    void clickClip(double start)
+    {
+        constexpr double IntoTheClip = 4.0;
+        m_user->clickChangeEvent(4);
+        m_user->save();
+        EXPECT_EQ(selectedChangeEvents(), std::vector<int>{4});
+        standin::Application host;
+        const standin::Project& project = host.openProject(m_file);
+        std::size_t row = 0;
+        while (TrackIndex(project).rows().at(row).track->name() != u"DIA 1")
+            ++row;
+        m_user->waitForRest(20);
+        EXPECT_NE(m_user->trackColour(project, row, start + IntoTheClip), Marked);
+        m_user->clickTrack(project, row, start + IntoTheClip);
+        m_user->save();
+        m_user->waitForRest(20);
+        EXPECT_EQ(m_user->trackColour(project, row, start + IntoTheClip), Marked);
     }
     /// Whether a take of the clip begins there on the first dialogue track of the file, in seconds of the project.
     bool hasClipAt(double start)
@@ -362,6 +386,29 @@ TEST_P(WholeDesktopTest, GivesTheKeysToTheTableThatIsClickedAfterABoxWasOpen)
     m_user->press(XK_Down);
     m_user->save();
     EXPECT_EQ(selectedChangeEvents(), std::vector<int>{4});
+}
+
+TEST_P(WholeDesktopTest, SelectsTheEventThatMovesTheClipThatIsClickedBeforeAndAfterTheRun)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->save();
+    m_user->press('f');
+    clickClip(OldStart);
+    EXPECT_EQ(selectedChangeEvents(), std::vector<int>{2});
+    EXPECT_EQ(timecodesOf(storedModel()->changeEdl())[2], "03:00:33:03 03:01:13:23 03:00:31:19 03:01:12:15");
+
+    m_user->click(DesktopUser::Main, "Cadrel Button");
+    m_user->waitForBox(true);
+    m_user->press(XK_Return); // Keep
+    m_user->waitForBox(false);
+    m_user->save();
+    m_user->press('f');
+    // The run has left out the first event, which moves nothing.
+    clickClip(NewStart);
+    EXPECT_EQ(selectedChangeEvents(), std::vector<int>{1});
+    EXPECT_EQ(timecodesOf(storedModel()->changeEdl())[1], "03:00:33:03 03:01:13:23 03:00:31:19 03:01:12:15");
 }
 
 TEST_P(WholeDesktopTest, GivesTheKeysToAQuestionHoweverItWasClickedFor)

@@ -58,6 +58,24 @@ TEST_F(WorkspaceTest, TellsWhyAProjectCannotBeOpened)
     EXPECT_EQ(documents.size(), 0U);
 }
 
+TEST_F(WorkspaceTest, TakesARecentProjectThatIsNotThereOffTheListWhereTheUserWantsThat)
+{
+    RecentFiles recent(folder / "recent.json");
+    const fs::path there = writeProject("there.stage");
+    const fs::path gone = folder / "gone.stage";
+    recent.add(there);
+    recent.add(gone);
+    EXPECT_TRUE(workspace.openRecent(recent, there));
+    EXPECT_EQ(lastMessage(), "");
+
+    boxes.answers = {u"Cancel", u"Take It off the List"};
+    EXPECT_FALSE(workspace.openRecent(recent, gone));
+    EXPECT_NE(lastMessage().find(gone.string()), std::string::npos) << lastMessage();
+    EXPECT_EQ(recent.paths(), (std::vector<fs::path>{gone, there}));
+    EXPECT_FALSE(workspace.openRecent(recent, gone));
+    EXPECT_EQ(recent.paths(), std::vector<fs::path>{there});
+}
+
 TEST_F(WorkspaceTest, OpensEachOfTheProjectsThatAreChosen)
 {
     boxes.choices = {
