@@ -33,7 +33,8 @@ fs::path homeFolder()
 } // namespace
 
 DesktopProgram::DesktopProgram(const ModulePlaces& places)
-    : m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
+    : m_window(WindowMemory(WindowMemory::defaultFile())),
+      m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
       m_documents(m_application, &m_recent), m_workspace(m_documents, m_boxes), m_stills(m_application.context())
 {
     MainView& view = m_window.view();
@@ -77,6 +78,7 @@ void DesktopProgram::run(const std::vector<fs::path>& projects)
 {
     later([=, this] { open(projects); });
     m_loop.runUntil([this] { return m_isDone; });
+    m_window.keepForm();
 }
 
 void DesktopProgram::idle(bool isWaiting)
@@ -96,6 +98,7 @@ void DesktopProgram::idle(bool isWaiting)
     if (now >= m_nextLook) {
         m_workspace.lookAtFile();
         m_workspace.lookAtAutosaves();
+        m_window.keepForm();
         m_nextLook = std::chrono::steady_clock::now() + LookInterval;
     }
     refresh();

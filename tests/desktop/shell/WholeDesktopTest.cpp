@@ -536,6 +536,66 @@ TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyM
     }
 }
 
+TEST_P(WholeDesktopTest, FitsOnTheScreenWithItsFrame)
+{
+    struct ScreenSize {
+        int width;
+        int height;
+    };
+    for (const auto& [width, height] : {ScreenSize{1366, 768}, {1600, 1000}, {1920, 1080}, {2560, 1440}}) {
+        SCOPED_TRACE(testing::Message() << width << " x " << height);
+        m_user.reset();
+        m_manager.reset();
+        const cadrel::tests::VirtualScreen screen(width, height);
+        if (GetParam())
+            m_manager.emplace();
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, 0, DesktopUser::Size::Own);
+        m_user->waitForRest(20);
+        const DesktopUser::Area frame = m_user->frame();
+        EXPECT_GE(frame.x, 0);
+        EXPECT_GE(frame.y, 0);
+        EXPECT_LE(frame.x + frame.width, width);
+        EXPECT_LE(frame.y + frame.height, height);
+        const DesktopUser::Area module = m_user->moduleArea();
+        EXPECT_LE(module.y + module.height, height);
+        EXPECT_GE(module.height, 450) << "most of it is Cadrel's";
+        m_user.reset();
+        m_manager.reset();
+        fs::remove_all(m_folder / "state");
+    }
+}
+
+TEST_P(WholeDesktopTest, ComesUpAsItWasTheLastTime)
+{
+    const auto quit = [this] {
+        m_user->press('q', XK_Control_L);
+        EXPECT_EQ(m_user->status(), 0);
+    };
+    const auto startAgain = [this] {
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, 0, DesktopUser::Size::Own);
+        m_user->waitForRest(20);
+    };
+    start();
+    m_user->resizeTo(1100, 900);
+    m_user->dragDivider(40);
+    const int top = m_user->moduleArea().y - m_user->area().y;
+    quit();
+    startAgain();
+    EXPECT_EQ(m_user->area().width, 1100);
+    EXPECT_EQ(m_user->area().height, 900);
+    EXPECT_EQ(m_user->moduleArea().y - m_user->area().y, top);
+    if (!GetParam())
+        return;
+    m_user->switchMaximised();
+    EXPECT_EQ(m_user->frame().width, 1400);
+    quit();
+    startAgain();
+    EXPECT_EQ(m_user->frame().width, 1400);
+    m_user->switchMaximised();
+    EXPECT_EQ(m_user->area().width, 1100) << "It is as large as before it was maximised.";
+    EXPECT_EQ(m_user->area().height, 900);
+}
+
 INSTANTIATE_TEST_SUITE_P(WithoutAndWithAWindowManager, WholeDesktopTest, testing::Bool(),
                          [](const auto& each) { return each.param ? "WithAWindowManager" : "WithoutAWindowManager"; });
 
