@@ -170,6 +170,17 @@ void EventTableModel::selectRows(const RowSet& rows)
     restore({});
 }
 
+bool EventTableModel::selectEvent(const std::shared_ptr<core::EventBase>& event)
+{
+    reloadIfStale();
+    const int row = m_rows.rowOf(event);
+    if (row < 0 || m_table == nullptr)
+        return false;
+    m_table->scrollToEnsureRowIsOnscreen(row);
+    m_table->selectRow(row);
+    return true;
+}
+
 void EventTableModel::setHighlight(const Events& events)
 {
     m_rows.setHighlight(events);

@@ -73,6 +73,7 @@ void JuceGuiAdapter::dispose() noexcept
     const juce::MessageManagerLock lock;
     leaveDesktop();
     resultOf([&] { removeChildComponent(m_content.get()); });
+    m_selectChange = {};
     m_content.reset();
     m_engine.reset();
 }
@@ -218,6 +219,13 @@ int32 JuceGuiAdapter::checkSizeConstraint(ViewRect& rect)
         rect.right = std::max(rect.right, rect.left + widthOf(least));
         rect.bottom = std::max(rect.bottom, rect.top + heightOf(least));
     });
+}
+
+int32 JuceGuiAdapter::selectChange(double source, double destination)
+{
+    bool isSelected = false;
+    resultOf([&] { isSelected = m_selectChange && m_selectChange(source, destination); });
+    return isSelected ? ResultOk : ResultFalse;
 }
 
 double JuceGuiAdapter::scale()
