@@ -227,7 +227,6 @@ Counted<Project> ArdourReader::read(ChangeLog& log)
     dropGoneTracks(*project);
     readLocations(*project);
     readVideo(*project);
-    m_session.contentEnd = contentEnd(*project);
     project->showChanges();
     project->clearChanges();
     return project;
@@ -606,6 +605,7 @@ void ArdourReader::readLocations(Project& project)
         if (hasFlag(flags, "IsSessionRange")) {
             m_session.sessionRange = read;
             project.setProjectEnd(clock.secondsOf(read.end));
+            setSessionEnd(project, clock.secondsOf(read.end));
         } else if (hasFlag(flags, "IsAutoLoop")) {
             project.cycleLeft().setValue(0, clock.secondsOf(read.start));
             project.cycleRight().setValue(0, clock.secondsOf(read.end));

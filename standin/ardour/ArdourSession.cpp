@@ -2,13 +2,24 @@
 
 #include "standin/ardour/ArdourSession.h"
 
+#include "standin/base/Times.h"
 #include "standin/project/Project.h"
 #include "standin/project/Track.h"
+#include "velmark/Attributes.h"
 
 #include <algorithm>
+#include <cmath>
 #include <string_view>
 
 namespace standin {
+
+using Velmark::AttributeKey;
+
+namespace {
+
+constexpr double NanosecondsPerSecond = 1e9;
+
+} // namespace
 
 bool hasKind(std::u16string_view location, std::u16string_view track)
 {
@@ -34,6 +45,22 @@ double contentEnd(const Project& project)
             latest = std::max(latest, track->contentEnd());
     }
     return latest;
+}
+
+std::optional<double> sessionEnd(const Project& project)
+{
+    const auto found = project.attributes().find(AttributeKey::SessionEnd);
+    if (found == project.attributes().end())
+        return std::nullopt;
+    const auto* const nanoseconds = std::get_if<Velmark::int64>(&found->second.value);
+    const double end = nanoseconds ? static_cast<double>(*nanoseconds) / NanosecondsPerSecond : -1.0;
+    return end >= 0.0 && end <= FurthestTime ? std::optional(end) : std::nullopt;
+}
+
+void setSessionEnd(Project& project, double seconds)
+{
+    const auto nanoseconds = static_cast<Velmark::int64>(std::round(seconds * NanosecondsPerSecond));
+    project.setAttribute(AttributeKey::SessionEnd, Attribute{nanoseconds, false});
 }
 
 SessionId attributeId(const Node& node, const char* key)

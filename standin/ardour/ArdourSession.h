@@ -37,6 +37,11 @@ SessionId attributeId(const Node& node, const char* key);
 /// Where the last clip of a project ends, in seconds.
 double contentEnd(const Project& project);
 
+/// Where the session of a project ends, in seconds; it stands in an attribute, so that a run can move it. Nothing without one
+/// that is a time of a project.
+std::optional<double> sessionEnd(const Project& project);
+void setSessionEnd(Project& project, double seconds);
+
 /// The text of a session, and where in it stands what a project can change.
 struct ArdourSession {
     /// The length of a fade that a region doesn't describe, in samples.
@@ -80,13 +85,11 @@ struct ArdourSession {
     std::map<SessionId, Location> locations;
     TextRange locationsElement;
     std::optional<Location> sessionRange;
-    double contentEnd = 0.0;           ///< where the last clip ended, in seconds
     TextRange extra;                   ///< empty without one
     TextRange own;                     ///< what Cadrel has put there; empty without
     std::string ownText;               ///< in it
     std::vector<SessionId> ownMarkers; ///< the locations of the markers in that text, in their order
     bool isOwnBroken = false;
-    bool isEndSet = false; ///< since it was read
     std::string ownAsRead; ///< what would be put there for the project as it was read
     /// The length of the fade at a new edge, in samples; 64 is Ardour's own.
     std::int64_t edgeFade = DefaultFade;

@@ -245,12 +245,9 @@ void ArdourWriter::writeSessionRange()
 {
     if (!m_session.sessionRange)
         return;
-    // It ends where the project was set to end or, where nobody has done so, with the last clip if that ends elsewhere now.
-    const SessionClock& clock = m_session.clock;
-    std::int64_t samples = clock.samplesOf(m_project.setEndTime());
-    if (!m_session.isEndSet && contentEnd(m_project) != m_session.contentEnd)
-        samples = clock.samplesOf(contentEnd(m_project));
-    samples = std::max(samples, m_session.sessionRange->start);
+    const std::optional<double> end = sessionEnd(m_project);
+    const std::int64_t samples =
+        end ? std::max(m_session.clock.samplesOf(*end), m_session.sessionRange->start) : m_session.sessionRange->end;
     if (samples == m_session.sessionRange->end)
         return;
     Element element(m_session.sessionRange->text, m_session.text);

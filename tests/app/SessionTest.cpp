@@ -105,6 +105,16 @@ TEST_F(Session, IsNotWrittenWhereItsSoundIsNot)
     EXPECT_TRUE(std::filesystem::is_empty(other.path()));
 }
 
+TEST_F(Session, EndsAsMuchLaterAsTheProgramme)
+{
+    folder.write("new.edl", NewEdl + "003  CAM003   V     C        12:00:00:00 12:00:01:00 00:00:04:00 00:00:05:00\n");
+    ASSERT_EQ(apply({"-o", output}).status, 0);
+    pugi::xml_document document;
+    ASSERT_TRUE(document.load_file(output.c_str()));
+    // 5 s.
+    EXPECT_STREQ(document.select_node("//Location[@name='session']").node().attribute("end").value(), "a1411200000");
+}
+
 TEST_F(Session, IsLeftAloneWhileArdourHasUnsavedWork)
 {
     folder.write("reel.pending", "<Session/>");

@@ -11,12 +11,14 @@
 #include "tests/standin/ardour/SessionText.h"
 #include "tests/support/NotQuadratic.h"
 #include "tests/support/SecondsOf.h"
+#include "velmark/Attributes.h"
 
 #include <gtest/gtest.h>
 #include <pugixml.hpp>
 
 #include <filesystem>
 #include <fstream>
+#include <limits>
 #include <set>
 #include <tuple>
 #include <utility>
@@ -702,23 +704,68 @@ TEST(ArdourForm, ReadsManyRoutesInTimeThatGrowsWithThem)
     });
 }
 
-TEST(ArdourForm, EndsTheSessionRangeWithTheProgramme)
+/// A session whose range is from 1 s to 10 s.
+class SessionRange : public testing::Test {
+protected:
+    /// What is written of it when its end is said to be there, in nanoseconds.
+    std::string endAt(Velmark::int64 nanoseconds)
+    {
+        session.project->setAttribute(Velmark::AttributeKey::SessionEnd, Attribute{nanoseconds, false});
+        return Parsed(session.text()).one("//Location").attribute("end").value();
+    }
+
+    const std::string text = SessionText{.locations = location(61, "session", 48000, 480000, "IsSessionRange"),
+                                         .regions = region(51, 0, 480000)};
+    const SessionProject session{text};
+};
+
+TEST_F(SessionRange, IsReadAsTheEndThatTheSessionHas)
 {
-    const SessionProject session(SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange"),
-                                             .regions = region(51, 0, 96000)});
-    eventAt(session.track("Dia"), 0).setSpan(20.0, 22.0);
-    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a6209280000");
+    Velmark::FVariant end;
+    ASSERT_EQ(session.project->getAttribute(Velmark::AttributeKey::SessionEnd, end), Velmark::ResultOk);
+    EXPECT_TRUE(end.isInteger());
+    EXPECT_EQ(end.asInteger(), 10'000'000'000);
 }
 
-TEST(ArdourForm, EndsTheSessionRangeWhereTheProjectWasSetToEndEvenIfThatIsWhereItEnded)
+TEST_F(SessionRange, IsNotReadFromASessionWithoutOne)
 {
-    const SessionProject session(SessionText{.locations = location(61, "session", 0, 480000, "IsSessionRange"),
-                                             .regions = region(51, 0, 480000)});
+    const SessionProject other{SessionText{}};
+    EXPECT_NE(other.project->hasAttribute(Velmark::AttributeKey::SessionEnd), Velmark::ResultOk);
+}
+
+TEST_F(SessionRange, EndsWhereItIsSaidToEndToTheSample)
+{
+    // 48,000 samples a second of 5,880 superclocks.
+    EXPECT_EQ(endAt(12'000'000'000), "a3386880000");
+    EXPECT_EQ(endAt(2'000'000'000), "a564480000");
+    // Sample 480,001 begins after 10.000020833 s.
+    EXPECT_EQ(endAt(10'000'020'833), "a2822405880");
+}
+
+TEST_F(SessionRange, DoesNotEndBeforeItBegins)
+{
+    EXPECT_EQ(endAt(1'000'000'000), "a282240000");
+    EXPECT_EQ(endAt(0), "a282240000");
+}
+
+TEST_F(SessionRange, StaysWhereItsEndIsNoTimeOfAProject)
+{
+    for (const Velmark::int64 absurd :
+         {std::numeric_limits<Velmark::int64>::min(), Velmark::int64{-1}, Velmark::int64{1'000'000'001'000'000'000},
+          std::numeric_limits<Velmark::int64>::max()})
+        EXPECT_EQ(endAt(absurd), "a2822400000") << absurd;
+}
+
+TEST_F(SessionRange, StaysWhenAClipAloneOrTheEndOfTheProjectMoves)
+{
     eventAt(session.track("Dia"), 0).setSpan(0.0, 8.0);
-    session.project->setProjectEnd(10.0);
-    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a2822400000");
     session.project->setProjectEnd(9.0);
-    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a2540160000");
+    EXPECT_STREQ(Parsed(session.text()).one("//Location").attribute("end").value(), "a2822400000");
+}
+
+TEST_F(SessionRange, LeavesTheTextAsItIs)
+{
+    EXPECT_EQ(session.text(), text);
 }
 
 TEST(ArdourForm, RefusesAClipThatTheSessionDoesNotHave)
