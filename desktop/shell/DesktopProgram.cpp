@@ -33,7 +33,8 @@ fs::path homeFolder()
 } // namespace
 
 DesktopProgram::DesktopProgram(const ModulePlaces& places)
-    : m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
+    : m_window(WindowMemory(WindowMemory::defaultFile())),
+      m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
       m_documents(m_application, &m_recent), m_workspace(m_documents, m_boxes), m_stills(m_application.context())
 {
     MainView& view = m_window.view();
@@ -77,33 +78,40 @@ void DesktopProgram::run(const std::vector<fs::path>& projects)
 {
     later([=, this] { open(projects); });
     m_loop.runUntil([this] { return m_isDone; });
+    m_window.keepForm();
 }
 
 void DesktopProgram::idle(bool isWaiting)
 {
     // While something waits for the user, the host isn't idle, but views of modules go on working.
-    if (isWaiting || m_boxes.isOpen()) {
+    const bool isHostIdle = !isWaiting && !m_boxes.isOpen();
+    endIfAsked(isHostIdle);
+    const auto now = std::chrono::steady_clock::now();
+    if (!isHostIdle) {
         m_application.views().idle();
+        m_documents.idleBeneathBox(now);
         return;
     }
-    doActs();
+    m_acts.run([this](const std::string& fault) { m_workspace.tell(fault); });
     m_application.idle();
-    const auto now = std::chrono::steady_clock::now();
     m_documents.idle(now);
     if (now >= m_nextLook) {
         m_workspace.lookAtFile();
         m_workspace.lookAtAutosaves();
+        m_window.keepForm();
         m_nextLook = std::chrono::steady_clock::now() + LookInterval;
     }
     refresh();
     refreshTracks();
 }
 
-void DesktopProgram::doActs()
+void DesktopProgram::endIfAsked(bool isHostIdle)
 {
-    // What comes meanwhile is done in the next idle time.
-    for (const auto& act : std::exchange(m_acts, {}))
-        act();
+    const int signal = EndSignals::received();
+    if (signal == 0)
+        return;
+    m_documents.leave(isHostIdle);
+    EndSignals::endBy(signal);
 }
 
 void DesktopProgram::choose(int command)

@@ -16,11 +16,6 @@ namespace {
 constexpr int HintFont = 0;
 constexpr std::chrono::milliseconds PaintTime(300);
 
-XContainer::Window windowOf(const juce::ComponentPeer* peer)
-{
-    return peer ? static_cast<XContainer::Window>(reinterpret_cast<std::uintptr_t>(peer->getNativeHandle())) : 0;
-}
-
 juce::Image imageOf(const XContainer::Picture& picture)
 {
     juce::Image image(juce::Image::RGB, picture.width, picture.height, false);
@@ -49,6 +44,11 @@ juce::KeyPress keyPressOf(const XContainer::Key& key)
 }
 
 } // namespace
+
+XContainer::Window windowOf(const juce::ComponentPeer* peer)
+{
+    return peer ? static_cast<XContainer::Window>(reinterpret_cast<std::uintptr_t>(peer->getNativeHandle())) : 0;
+}
 
 class EmbeddedView::Window : public standin::NativeWindow {
 public:

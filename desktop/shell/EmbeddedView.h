@@ -13,6 +13,9 @@
 
 namespace desktop {
 
+/// The X window of a component; 0 for none.
+XContainer::Window windowOf(const juce::ComponentPeer* peer);
+
 /// The place of a module's window in the window of the host. The module's view lies in an X window of its own over this component,
 /// which has its size. There is one such window at a time.
 class EmbeddedView : public juce::Component, public standin::WindowSystem {

@@ -16,6 +16,13 @@ namespace desktop {
 
 using namespace Velmark;
 
+namespace {
+
+/// Reading a long list anew for each key would hold the user up: it may take one part in so many of the time.
+constexpr int LookShare = 20;
+
+} // namespace
+
 /// Tells the view that the project has changed.
 class ProjectTracks::Dependent : public Implements<Dependent, FObject> {
 public:
@@ -72,7 +79,13 @@ void ProjectTracks::idle()
 {
     if (const auto clicked = std::exchange(m_clicked, std::nullopt))
         select(*clicked);
-    if (!m_change.look(*m_project))
+    const auto start = Clock::now();
+    if (start < m_nextLook)
+        return;
+    const bool isNew = m_change.look(*m_project);
+    const auto end = Clock::now();
+    m_nextLook = end + LookShare * (end - start);
+    if (!isNew)
         return;
     m_view->setChange(m_change.map());
     // The user may have scrolled elsewhere since.

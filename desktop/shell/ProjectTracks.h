@@ -8,6 +8,7 @@
 #include "velmark/Counted.h"
 #include "velmark/FObject.h"
 
+#include <chrono>
 #include <cstddef>
 #include <memory>
 #include <optional>
@@ -36,6 +37,7 @@ public:
 
 private:
     class Dependent;
+    using Clock = std::chrono::steady_clock;
     /// The event that the view has scrolled to, or on one of whose clips the user has clicked there.
     struct SeenEvent {
         ChangeMap::Move move;
@@ -52,6 +54,7 @@ private:
     std::unique_ptr<TracksView> m_view;
     Velmark::Counted<Dependent> m_dependent;
     StoredChange m_change;
+    Clock::time_point m_nextLook{};
     std::optional<SeenEvent> m_seen;
     std::optional<std::size_t> m_clicked; ///< and not selected yet
 };

@@ -227,7 +227,6 @@ Counted<Project> ArdourReader::read(ChangeLog& log)
     dropGoneTracks(*project);
     readLocations(*project);
     readVideo(*project);
-    m_session.contentEnd = contentEnd(*project);
     project->showChanges();
     project->clearChanges();
     return project;
@@ -446,7 +445,9 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
         read.position = clock.samples(region.attribute("position").value());
         read.length = clock.samples(length);
     }
-    read.start = clock.samples(region.attribute("start").value());
+    const std::string_view start = region.attribute("start").value();
+    read.start = clock.samples(start);
+    read.isMusical = clock.hasUnits() && (SessionClock::isMusical(start) || length.find('b') != length.npos);
     const SessionId source = idIn(region.attribute("source-0").value()).value_or(-1);
     read.source = source;
     if (region.child("Extra")) {
@@ -604,6 +605,7 @@ void ArdourReader::readLocations(Project& project)
         if (hasFlag(flags, "IsSessionRange")) {
             m_session.sessionRange = read;
             project.setProjectEnd(clock.secondsOf(read.end));
+            setSessionEnd(project, clock.secondsOf(read.end));
         } else if (hasFlag(flags, "IsAutoLoop")) {
             project.cycleLeft().setValue(0, clock.secondsOf(read.start));
             project.cycleRight().setValue(0, clock.secondsOf(read.end));
@@ -685,6 +687,14 @@ void ArdourReader::placeMarkersOfTheUser(Project& project)
     }
 }
 
+bool ArdourReader::isOwn(const ArdourSession::Location& location, const Track& track, const Node& marker) const
+{
+    const SessionClock& clock = m_session.clock;
+    const bool isInPlace =
+        location.start == clock.samplesOf(marker.start()) && location.end == clock.samplesOf(marker.end());
+    return isInPlace || hasKind(textOf(location.name), track.name());
+}
+
 void ArdourReader::placeOwnMarkers(Project& project)
 {
     const std::vector<Node*> markers = OwnStorage::markersOf(project);
@@ -695,7 +705,8 @@ void ArdourReader::placeOwnMarkers(Project& project)
         const SessionId id = index < m_session.ownMarkers.size() ? m_session.ownMarkers[index] : 0;
         const auto found = m_session.locations.find(id);
         // One that was removed in Ardour is gone.
-        if (found == m_session.locations.end() || !m_ownLocations.insert(id).second)
+        if (found == m_session.locations.end() || !isOwn(found->second, track, *marker) ||
+            !m_ownLocations.insert(id).second)
             continue;
         const ArdourSession::Location& location = found->second;
         marker->setSpan(m_session.clock.secondsOf(location.start), m_session.clock.secondsOf(location.end));

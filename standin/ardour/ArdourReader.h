@@ -59,6 +59,9 @@ private:
     void readLocations(Project& project);
     void readVideo(Project& project);
     void placeOwnMarkers(Project& project);
+    /// Whether a location that is said to stand for a marker on a track of Cadrel's has its place or the kind in its name. One
+    /// that has neither is the user's.
+    bool isOwn(const ArdourSession::Location& location, const Track& track, const Node& marker) const;
     void placeMarkersOfTheUser(Project& project);
 
     TextRange rangeOf(const pugi::xml_node& node) const;

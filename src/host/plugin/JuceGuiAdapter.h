@@ -63,9 +63,9 @@ public:
     /// Makes it at least the minimum size, or the screen's where that is smaller.
     Velmark::int32 checkSizeConstraint(Velmark::ViewRect& rect) override;
     Velmark::int32 isPlatformTypeSupported(const char* type) override;
-
     Velmark::int32 selectChange(double source, double destination) override;
 
+    void paint(juce::Graphics& graphics) override;
     void resized() override;
     void childBoundsChanged(juce::Component* child) override;
     /// What no component has used: undo and redo are the host's actions, Tab moves the keyboard, and the rest goes on to the

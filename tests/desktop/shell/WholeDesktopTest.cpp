@@ -8,6 +8,7 @@
 #include "core/time/Framerate.h"
 #include "core/time/Timecode.h"
 #include "desktop/document/Autosave.h"
+#include "desktop/document/DocumentLock.h"
 #include "desktop/tracks/TrackIndex.h"
 #include "gui/look/Palette.h"
 #include "gui/table/StoredTable.h"
@@ -554,12 +555,31 @@ TEST_P(WholeDesktopTest, OffersUnsavedWorkAfterItWasKilled)
     EXPECT_FALSE(fs::exists(kept));
 }
 
+TEST_P(WholeDesktopTest, KeepsUnsavedWorkWhenTheSystemEndsIt)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->waitForTitle("there is unsaved work", [](const std::string& text) { return text.starts_with("*"); });
+    if (GetParam()) {
+        m_user->closeWindow();
+        m_user->waitForBox(true);
+    }
+    m_user->signalProgram(GetParam() ? SIGHUP : SIGTERM);
+    EXPECT_EQ(m_user->status(), -1);
+    EXPECT_TRUE(storedModel()->changeEdl().isEmpty());
+    EXPECT_FALSE(fs::exists(DocumentLock::pathFor(m_file)));
+
+    EXPECT_TRUE(recover());
+    EXPECT_EQ(storedModel()->changeEdl().size(), 60U);
+}
+
 // A few times; the variable CADREL_KILLS says how often else.
 TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyMoment)
 {
     constexpr int Longest = 5000;
     const char* const wanted = std::getenv("CADREL_KILLS");
-    const int count = wanted ? std::atoi(wanted) : 2;
+    const int count = wanted ? std::atoi(wanted) : 4;
     std::mt19937 random(GetParam() ? 2 : 1);
     int offered = 0;
     for (int trial = 0; trial < count; ++trial) {
@@ -574,6 +594,66 @@ TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyM
     if (count >= 20) {
         EXPECT_GE(offered, count / 5);
     }
+}
+
+TEST_P(WholeDesktopTest, FitsOnTheScreenWithItsFrame)
+{
+    struct ScreenSize {
+        int width;
+        int height;
+    };
+    for (const auto& [width, height] : {ScreenSize{1366, 768}, {1600, 1000}, {1920, 1080}, {2560, 1440}}) {
+        SCOPED_TRACE(testing::Message() << width << " x " << height);
+        m_user.reset();
+        m_manager.reset();
+        const cadrel::tests::VirtualScreen screen(width, height);
+        if (GetParam())
+            m_manager.emplace();
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, 0, DesktopUser::Size::Own);
+        m_user->waitForRest(20);
+        const DesktopUser::Area frame = m_user->frame();
+        EXPECT_GE(frame.x, 0);
+        EXPECT_GE(frame.y, 0);
+        EXPECT_LE(frame.x + frame.width, width);
+        EXPECT_LE(frame.y + frame.height, height);
+        const DesktopUser::Area module = m_user->moduleArea();
+        EXPECT_LE(module.y + module.height, height);
+        EXPECT_GE(module.height, 450) << "most of it is Cadrel's";
+        m_user.reset();
+        m_manager.reset();
+        fs::remove_all(m_folder / "state");
+    }
+}
+
+TEST_P(WholeDesktopTest, ComesUpAsItWasTheLastTime)
+{
+    const auto quit = [this] {
+        m_user->press('q', XK_Control_L);
+        EXPECT_EQ(m_user->status(), 0);
+    };
+    const auto startAgain = [this] {
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, 0, DesktopUser::Size::Own);
+        m_user->waitForRest(20);
+    };
+    start();
+    m_user->resizeTo(1100, 900);
+    m_user->dragDivider(40);
+    const int top = m_user->moduleArea().y - m_user->area().y;
+    quit();
+    startAgain();
+    EXPECT_EQ(m_user->area().width, 1100);
+    EXPECT_EQ(m_user->area().height, 900);
+    EXPECT_EQ(m_user->moduleArea().y - m_user->area().y, top);
+    if (!GetParam())
+        return;
+    m_user->switchMaximised();
+    EXPECT_EQ(m_user->frame().width, 1400);
+    quit();
+    startAgain();
+    EXPECT_EQ(m_user->frame().width, 1400);
+    m_user->switchMaximised();
+    EXPECT_EQ(m_user->area().width, 1100) << "It is as large as before it was maximised.";
+    EXPECT_EQ(m_user->area().height, 900);
 }
 
 INSTANTIATE_TEST_SUITE_P(WithoutAndWithAWindowManager, WholeDesktopTest, testing::Bool(),
