@@ -427,25 +427,6 @@ private:
 };
 
 /// Runs, and adds what that did to the project.
-/// Where the last event of a cut ends, in seconds of its timecode.
-double endOf(const core::EventList& cut)
-{
-    double end = 0.0;
-    for (std::size_t index = 0; index < cut.size(); ++index) {
-        if (cut.at(index).isValid())
-            end = std::max(end, cut.at(index).dstOut().toSeconds());
-    }
-    return end;
-}
-
-/// A session says itself where it ends, and ends with the programme.
-void moveEnd(standin::Project& project, const core::DataModel& model)
-{
-    if (!project.form() || model.oldEdl().isEmpty() || model.newEdl().isEmpty())
-        return;
-    project.setProjectEnd(std::max(project.setEndTime() + endOf(model.newEdl()) - endOf(model.oldEdl()), 0.0));
-}
-
 void apply(HostedProject& hosted, const KeptRun* kept, ApplyFacts& facts)
 {
     ProjectState before = stateOf(hosted.project());
@@ -458,8 +439,6 @@ void apply(HostedProject& hosted, const KeptRun* kept, ApplyFacts& facts)
     if (!kept || kept->needsRun()) {
         const auto changed = changedRange(hosted.model().settings(), kept);
         forgetReplacedMarkers(before, changed ? &*changed : nullptr, facts.timeOrigin);
-        if (facts.cuts)
-            moveEnd(hosted.project(), hosted.model());
     }
     facts.tracks = compare(before, hosted.project(), shiftOf(hosted.model(), kept, facts.timeOrigin));
 }

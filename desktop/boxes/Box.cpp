@@ -86,6 +86,16 @@ void Box::parentHierarchyChanged()
     fillParent();
 }
 
+void Box::keepFocus(juce::Component* focused)
+{
+    if (isParentOf(focused))
+        m_lastFocus = focused;
+    else if (m_lastFocus && m_lastFocus->isShowing())
+        m_lastFocus->grabKeyboardFocus();
+    else if (focused != this)
+        takeFocus();
+}
+
 void Box::fillParent()
 {
     if (const Component* const parent = getParentComponent())

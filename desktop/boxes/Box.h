@@ -13,6 +13,10 @@ class Box : public cadrel::gui::Sheet {
 public:
     Box(const juce::String& name, const juce::String& title);
 
+    /// To be told over and over what has the keyboard in the window, or null. Where that isn't one of the box's controls, as after
+    /// a click beside them, the control gets it back that had it last.
+    void keepFocus(juce::Component* focused);
+
     /// Whether the user is done with it.
     bool isDone() const { return m_isDone; }
 
@@ -43,6 +47,7 @@ private:
     int m_panelWidth = 480;
     int m_panelHeight = 200;
     bool m_isDone = false;
+    SafePointer<Component> m_lastFocus; ///< among the controls
 };
 
 } // namespace desktop

@@ -49,7 +49,8 @@ std::vector<std::u16string> Boxes::chooseFiles(const FileQuestion& question)
         enum { Yes, Cancel };
         return ask("Save", text, {yes, "Cancel"}, Cancel) == Yes;
     };
-    FileBox box(question, m_folders.startOf(standin::toUtf8(question.folder)), askBack);
+    const auto tell = [this](const juce::String& text) { ask("Cadrel", text, {"OK"}, 0); };
+    FileBox box(question, m_folders.startOf(standin::toUtf8(question.folder)), askBack, tell);
     run(box);
     std::vector<std::u16string> files;
     for (const std::filesystem::path& file : box.files())
@@ -74,6 +75,7 @@ bool Boxes::showProgress(const Progress& progress)
     } else if (now - m_progressServed < ProgressInterval)
         return m_progress->isCancelled();
     m_progress->update(progress);
+    keepKeyboard();
     m_loop.turnWithoutWaiting();
     m_progressServed = Clock::now();
     return m_progress->isCancelled();
@@ -112,8 +114,20 @@ void Boxes::hide(Box& box)
 void Boxes::run(Box& box)
 {
     show(box);
-    m_loop.runUntil([&] { return box.isDone(); });
+    m_loop.runUntil([&] {
+        keepKeyboard();
+        return box.isDone();
+    });
     hide(box);
+}
+
+/// A window that gets the keyboard from another one gives it to what had it before, or to nothing, even if a box has come up since.
+void Boxes::keepKeyboard()
+{
+    juce::Component* const focused = juce::Component::getCurrentlyFocusedComponent();
+    const juce::ComponentPeer* const peer = m_window.getPeer();
+    if (focused ? m_window.isParentOf(focused) : peer && peer->isFocused())
+        m_open.back()->keepFocus(focused);
 }
 
 } // namespace desktop

@@ -44,6 +44,8 @@ private:
     void show(Box& box);
     void hide(Box& box);
     void run(Box& box);
+    /// Leaves the keyboard of the window to the box in front.
+    void keepKeyboard();
 
     EventLoop& m_loop;
     juce::Component& m_window;

@@ -11,6 +11,7 @@
 #include "host/border/HostFailure.h"
 #include "host/project/FramerateScope.h"
 #include "host/project/Project.h"
+#include "host/project/SessionEnd.h"
 #include "host/services/ProgressHandler.h"
 #include "host/undo/DataModelEditStep.h"
 #include "host/undo/PreviewEventsStep.h"
@@ -206,6 +207,7 @@ Result::Type Host::runCadrel()
             const auto command = createCommand(handle);
             requireSuccess(removeVirginTerritoryMarkers());
             project.createMarkerTracks(transaction);
+            const SessionEnd sessionEnd(project);
             const Result::Type ran = run(changeList);
             if (ran == Result::Cancelled) {
                 actions = required(service<IActionManager>(m_context));
@@ -221,6 +223,7 @@ Result::Type Host::runCadrel()
             double end = 0.0;
             project.getApplyRange(start, end);
             project.closeRange(isOnlySelected(project.model().settings()), start, end);
+            sessionEnd.follow(allowed);
             noteRun(project, allowed, transaction);
         }));
         if (actions) {

@@ -133,6 +133,9 @@ struct AttributeKey {
     static constexpr const char* PreviewCurves = "Cadrel:PreviewCurves";
     /// On the project while a preview has room past its end: an IAttributeData with numbers.
     static constexpr const char* ProjectEnd = "Cadrel:ProjectEnd";
+    /// On a project whose session has an end of its own: that end in nanoseconds from the time origin, an integer. The host
+    /// sets it when it opens the project, not as a persistent one, and stores the session with the end that stands there.
+    static constexpr const char* SessionEnd = "Cadrel:SessionEnd";
     /// In these lists: the numbers.
     static constexpr const char* Numbers = "Numbers";
     /// On a marker, a video and a folder track: the role of the track, an integer.

@@ -37,7 +37,6 @@ public:
     bool hasBrokenStorage() const override { return m_session.isOwnBroken; }
     std::vector<std::string> staying() const override { return m_session.staying; }
     void setEdgeFade(double seconds) override { m_session.edgeFade = m_session.clock.samplesOf(seconds); }
-    void endWasSet() override { m_session.isEndSet = true; }
 
 private:
     ArdourSession m_session;

@@ -12,6 +12,7 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -27,11 +28,19 @@ using SessionId = std::int64_t;
 /// its track, but once.
 std::u16string ownLocationName(const std::u16string& track, const std::u16string& marker);
 
+/// Whether a location's name begins with the kind, whatever letters are large.
+bool hasKind(std::u16string_view location, std::u16string_view track);
+
 /// The id that an attribute of a node holds; 0 without one.
 SessionId attributeId(const Node& node, const char* key);
 
 /// Where the last clip of a project ends, in seconds.
 double contentEnd(const Project& project);
+
+/// Where the session of a project ends, in seconds; it stands in an attribute, so that a run can move it. Nothing without one
+/// that is a time of a project.
+std::optional<double> sessionEnd(const Project& project);
+void setSessionEnd(Project& project, double seconds);
 
 /// The text of a session, and where in it stands what a project can change.
 struct ArdourSession {
@@ -47,6 +56,7 @@ struct ArdourSession {
         SessionId source = 0;
         std::optional<CutMark> head{}; ///< of an edge at which an earlier run has cut
         std::optional<CutMark> tail{};
+        bool isMusical = false; ///< one of its times was told in beats
     };
     struct List {
         TextRange text;
@@ -75,13 +85,11 @@ struct ArdourSession {
     std::map<SessionId, Location> locations;
     TextRange locationsElement;
     std::optional<Location> sessionRange;
-    double contentEnd = 0.0;           ///< where the last clip ended, in seconds
     TextRange extra;                   ///< empty without one
     TextRange own;                     ///< what Cadrel has put there; empty without
     std::string ownText;               ///< in it
     std::vector<SessionId> ownMarkers; ///< the locations of the markers in that text, in their order
     bool isOwnBroken = false;
-    bool isEndSet = false; ///< since it was read
     std::string ownAsRead; ///< what would be put there for the project as it was read
     /// The length of the fade at a new edge, in samples; 64 is Ardour's own.
     std::int64_t edgeFade = DefaultFade;

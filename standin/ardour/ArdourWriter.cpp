@@ -113,6 +113,10 @@ void ArdourWriter::writeRegion(const ArdourSession::Region& region, const std::v
         m_patch.remove(region.text);
         return;
     }
+    if (pieces.size() == 1 && pieces.front().isWhole(region) && !region.isMusical) {
+        moveRegion(region, pieces.front().position);
+        return;
+    }
     const auto next = [this] { return newId(); };
     const unsigned depth = depthOf(region.text, m_session.text);
     std::string text;
@@ -128,6 +132,23 @@ void ArdourWriter::writeRegion(const ArdourSession::Region& region, const std::v
         text += printed(element.node, depth);
     }
     m_patch.replace(region.text, std::move(text));
+}
+
+void ArdourWriter::moveRegion(const ArdourSession::Region& region, std::int64_t position)
+{
+    const SessionClock& clock = m_session.clock;
+    const std::string place = clock.timeText(position);
+    const std::string length = clock.timeText(region.length);
+    visitAttributes(startTagOf(region.text, m_session.text), m_session.text,
+                    [&](std::string_view name, const TextRange& value) {
+                        if (name == "length" && clock.hasUnits())
+                            m_patch.replace(value, length + "@" + place);
+                        else if (name == "position" && !clock.hasUnits())
+                            m_patch.replace(value, place);
+                        // It stands at a sample now, not at a beat.
+                        else if (name == "positional-lock-style" && !clock.hasUnits())
+                            m_patch.replace(value, "AudioTime");
+                    });
 }
 
 void ArdourWriter::writeLists()
@@ -224,12 +245,9 @@ void ArdourWriter::writeSessionRange()
 {
     if (!m_session.sessionRange)
         return;
-    // It ends where the project was set to end or, where nobody has done so, with the last clip if that ends elsewhere now.
-    const SessionClock& clock = m_session.clock;
-    std::int64_t samples = clock.samplesOf(m_project.setEndTime());
-    if (!m_session.isEndSet && contentEnd(m_project) != m_session.contentEnd)
-        samples = clock.samplesOf(contentEnd(m_project));
-    samples = std::max(samples, m_session.sessionRange->start);
+    const std::optional<double> end = sessionEnd(m_project);
+    const std::int64_t samples =
+        end ? std::max(m_session.clock.samplesOf(*end), m_session.sessionRange->start) : m_session.sessionRange->end;
     if (samples == m_session.sessionRange->end)
         return;
     Element element(m_session.sessionRange->text, m_session.text);

@@ -44,7 +44,9 @@ std::string forXml(std::string json)
 std::string OwnStorage::textOf(const Project& project)
 {
     const std::vector<Track*> tracks = project.allTracks();
-    if (project.attributes().empty() && std::ranges::none_of(tracks, [](const Track* t) { return hasOwn(*t); }))
+    const auto isStored = [](const auto& attribute) { return attribute.second.isPersistent; };
+    if (std::ranges::none_of(project.attributes(), isStored) &&
+        std::ranges::none_of(tracks, [](const Track* t) { return hasOwn(*t); }))
         return std::string();
     // A track is asked for before what is on it.
     const Track* around = nullptr;

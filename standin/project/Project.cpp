@@ -69,8 +69,6 @@ int32 Project::setProjectEnd(double seconds)
         return ResultFalse;
     if (seconds != m_endTime)
         change(*this, &Project::exchangeEndTime, seconds);
-    if (m_form)
-        m_form->endWasSet();
     return ResultOk;
 }
 

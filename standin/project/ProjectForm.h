@@ -36,8 +36,6 @@ public:
     virtual std::vector<std::string> staying() const = 0;
     /// How long a clip fades in or out where an edit has cut it, in seconds.
     virtual void setEdgeFade(double seconds) = 0;
-    /// Somebody has set where the project ends, be it to where it ended before.
-    virtual void endWasSet() = 0;
 };
 
 } // namespace standin

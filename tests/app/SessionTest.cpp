@@ -6,9 +6,7 @@
 #include "tests/standin/ardour/SessionText.h"
 
 #include <filesystem>
-#include <fstream>
 #include <gtest/gtest.h>
-#include <iterator>
 #include <nlohmann/json.hpp>
 #include <pugixml.hpp>
 
@@ -26,12 +24,6 @@ const std::string OldEdl = "TITLE: OLD\nFCM: NON-DROP FRAME\n"
 const std::string NewEdl = "TITLE: NEW\nFCM: NON-DROP FRAME\n"
                            "001  CAM002   V     C        11:00:00:00 11:00:02:00 00:00:00:00 00:00:02:00\n"
                            "002  CAM001   V     C        10:00:00:00 10:00:02:00 00:00:02:00 00:00:04:00\n";
-
-std::string contentOf(const std::filesystem::path& file)
-{
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
 
 class Session : public testing::Test {
 protected:
@@ -111,6 +103,16 @@ TEST_F(Session, IsNotWrittenWhereItsSoundIsNot)
     EXPECT_EQ(outcome.status, 1);
     EXPECT_NE(outcome.err.find("lies outside of the session's folder"), std::string::npos) << outcome.err;
     EXPECT_TRUE(std::filesystem::is_empty(other.path()));
+}
+
+TEST_F(Session, EndsAsMuchLaterAsTheProgramme)
+{
+    folder.write("new.edl", NewEdl + "003  CAM003   V     C        12:00:00:00 12:00:01:00 00:00:04:00 00:00:05:00\n");
+    ASSERT_EQ(apply({"-o", output}).status, 0);
+    pugi::xml_document document;
+    ASSERT_TRUE(document.load_file(output.c_str()));
+    // 5 s.
+    EXPECT_STREQ(document.select_node("//Location[@name='session']").node().attribute("end").value(), "a1411200000");
 }
 
 TEST_F(Session, IsLeftAloneWhileArdourHasUnsavedWork)

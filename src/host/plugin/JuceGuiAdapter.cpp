@@ -20,6 +20,9 @@ using namespace Velmark;
 
 namespace {
 
+/// That of the content.
+const juce::Colour Background(0xff070c10);
+
 constexpr ViewRect MinimumRect{0, 0, JuceGuiAdapter::MinimumWidth, JuceGuiAdapter::MinimumHeight};
 
 int32 widthOf(const ViewRect& rect)
@@ -57,6 +60,7 @@ JuceGuiAdapter::JuceGuiAdapter(std::unique_ptr<juce::Component> content, IHostCo
     setSize(MinimumWidth, MinimumHeight);
     addAndMakeVisible(*m_content, -1);
     layOutContent();
+    addMouseListener(this, true);
 }
 
 JuceGuiAdapter::~JuceGuiAdapter()
@@ -69,6 +73,7 @@ void JuceGuiAdapter::dispose() noexcept
     const juce::MessageManagerLock lock;
     leaveDesktop();
     resultOf([&] { removeChildComponent(m_content.get()); });
+    m_selectChange = {};
     m_content.reset();
     m_engine.reset();
 }
@@ -99,10 +104,12 @@ int32 JuceGuiAdapter::attached(void* parent, const char* type)
 
 void JuceGuiAdapter::attachTo(void* parent)
 {
+    // Without a server JUCE has no screen, and would make a window that isn't anywhere.
+    if (!juce::Desktop::getInstance().getDisplays().getPrimaryDisplay())
+        throw util::Result::HostObjectMissing;
     setVisible(true);
     removeFromDesktop();
     addToDesktop(0, parent);
-    // Without a server JUCE makes a window that isn't anywhere.
     if (!getPeer() || !getPeer()->getNativeHandle())
         throw util::Result::HostObjectMissing;
     setVisible(true);
@@ -134,13 +141,15 @@ int32 JuceGuiAdapter::idle()
 {
     // A host may give the view back in the midst of it.
     const auto self = Counted<JuceGuiAdapter>::share(this);
-    return resultOf([&] {
+    const util::Result::Type result = resultOf([&] {
         if (m_unusedKeys)
             m_unusedKeys->beginServing();
         // The view may be removed meanwhile.
         if (serve() && m_unusedKeys)
             m_unusedKeys->endServing();
     });
+    endPassingOver();
+    return result;
 }
 
 int32 JuceGuiAdapter::onWheel(float distance)
@@ -212,6 +221,13 @@ int32 JuceGuiAdapter::checkSizeConstraint(ViewRect& rect)
     });
 }
 
+int32 JuceGuiAdapter::selectChange(double source, double destination)
+{
+    bool isSelected = false;
+    resultOf([&] { isSelected = m_selectChange && m_selectChange(source, destination); });
+    return isSelected ? ResultOk : ResultFalse;
+}
+
 double JuceGuiAdapter::scale()
 {
     return juce::Desktop::getInstance().getGlobalScaleFactor();
@@ -230,6 +246,12 @@ ViewRect JuceGuiAdapter::rectOnScreen(juce::Rectangle<int> size) const
         size = size.withSize(std::min(size.getWidth(), area.getWidth()), std::min(size.getHeight(), area.getHeight()));
     }
     return rectOf(size);
+}
+
+void JuceGuiAdapter::paint(juce::Graphics& graphics)
+{
+    // A content that is shown smaller may leave a part of the last pixels free.
+    graphics.fillAll(Background);
 }
 
 void JuceGuiAdapter::resized()
@@ -272,6 +294,33 @@ bool JuceGuiAdapter::keyPressed(const juce::KeyPress& key)
     if (!key.isKeyCode(juce::KeyPress::tabKey) && !m_keyIsFromHost && m_unusedKeys)
         m_unusedKeys->sendOn(key.getKeyCode(), key.getTextCharacter());
     return false;
+}
+
+void JuceGuiAdapter::focusOfChildComponentChanged(FocusChangeType /*cause*/)
+{
+    if (!hasKeyboardFocus(true))
+        m_hasLostKeyboard = true;
+}
+
+void JuceGuiAdapter::mouseDown(const juce::MouseEvent& /*event*/)
+{
+    juce::ComponentPeer* const peer = getPeer();
+    if (!std::exchange(m_hasLostKeyboard, false) || !peer || !hasKeyboardFocus(true))
+        return;
+    // A window manager may take the keyboard away just before a click. The click gets it back, and JUCE hears of that afterwards.
+    // It would then hand the keyboard to the component that had it before.
+    juce::Component* const former = peer->getLastFocusedSubcomponent();
+    if (former == this || former == getCurrentlyFocusedComponent() || !former->getWantsKeyboardFocus())
+        return;
+    former->setWantsKeyboardFocus(false);
+    m_passedOver = former;
+}
+
+void JuceGuiAdapter::endPassingOver()
+{
+    if (m_passedOver)
+        m_passedOver->setWantsKeyboardFocus(true);
+    m_passedOver = nullptr;
 }
 
 bool JuceGuiAdapter::invokeEditAction(const char* action)

@@ -38,4 +38,14 @@ void MemoMark::keepOn(IProjectNode& copy) const
     requireOk(copy.setAttribute(AttributeKey::Followed, FVariant::integer(number), true));
 }
 
+void MemoMark::renewOn(IProjectNode& copy)
+{
+    of(copy).keepOn(copy);
+}
+
+bool MemoMark::isUpToDateOn(IProjectNode& copy)
+{
+    return keptBy(copy) == of(copy);
+}
+
 } // namespace cadrel::host

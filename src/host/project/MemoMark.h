@@ -25,6 +25,10 @@ struct MemoMark {
     static std::optional<MemoMark> keptBy(Velmark::IProjectNode& copy);
     /// Throws Result::HostCallFailed when the host refuses.
     void keepOn(Velmark::IProjectNode& copy) const;
+    /// Keeps on a copy what it is like now. Throws as keepOn does.
+    static void renewOn(Velmark::IProjectNode& copy);
+    /// Whether a copy is as it was when it was written or its memo followed it last. False for what keeps no mark.
+    static bool isUpToDateOn(Velmark::IProjectNode& copy);
 };
 
 } // namespace cadrel::host

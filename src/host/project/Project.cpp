@@ -271,10 +271,10 @@ void Project::syncMemos(IEditTransaction& transaction)
     if (!memoTrack().hasChanged())
         return;
     Track& memos = markerTrack(TrackRole::Memos);
-    const MemoSync::Previewed shown = previewed();
+    const PreviewedEvents shown = previewed();
     m_memoSync.follow(memos, shown, transaction);
     // Only now, as they may get the id of one whose copy the user has just removed.
-    memos.assignIds(0.0, shown.offset + shown.moved - timeOrigin());
+    memos.assignIds(0.0, shown.start() - timeOrigin());
 }
 
 void Project::rememberMemos()

@@ -246,7 +246,7 @@ private:
     void tellListeners(FirstFailure& failure);
     bool isPreviewing() const;
     /// With the rate and the time origin of when it was written.
-    MemoSync::Previewed previewed();
+    PreviewedEvents previewed();
     /// What is kept of the preview that stands there: by the memos' track or, where it keeps nothing, by the first that does.
     std::optional<PreviewRecord::Head> writtenHead();
     /// Of the last event of any track, from the time origin.

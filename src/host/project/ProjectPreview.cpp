@@ -7,6 +7,8 @@
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
 #include "host/project/EventPrint.h"
+#include "host/project/MemoMark.h"
+#include "host/project/MemoSync.h"
 #include "host/project/PreviewRecord.h"
 #include "host/project/Project.h"
 #include "host/track/HeldPoint.h"
@@ -168,7 +170,7 @@ void Project::rememberWritten()
         findMarkerTracks();
         for (const HostEvent& memo : markerTrack(TrackRole::Memos).clipEvents()) {
             if (!isBefore(memo.getStart(), *start + timeOrigin()))
-                MemoSync::markFollowed(memo);
+                MemoMark::renewOn(*memo.node());
         }
     });
     for (const Track& track : cadrelTracks()) {
@@ -255,7 +257,7 @@ void Project::removeFollowed(IEditTransaction& transaction, double start)
     std::set<std::int64_t> ids;
     std::vector<Node> followed;
     for (const HostEvent& memo : memos.clipEvents()) {
-        if (!isBefore(memo.getEnd(), begin) && MemoSync::isFollowed(memo))
+        if (!isBefore(memo.getEnd(), begin) && MemoMark::isUpToDateOn(*memo.node()))
             followed.push_back(Node::share(memo.node()));
         else if (isBefore(memo.getStart(), begin))
             ids.insert(memo.getUserId());
@@ -281,7 +283,7 @@ void Project::findPreviewedTracks()
     }
 }
 
-MemoSync::Previewed Project::previewed()
+PreviewedEvents Project::previewed()
 {
     const double offset = requiredOffset();
     const double origin = timeOrigin();

@@ -574,6 +574,27 @@ TEST_F(JuceGuiAdapterTest, TakesTheKeyboardBackThatItHasLostSinceItLastLooked)
     EXPECT_TRUE(turnUntil([this] { return has("key A"); }));
 }
 
+// Window managers do so with a click: first their window gets the keyboard, and then the click comes.
+TEST_F(JuceGuiAdapterTest, GivesTheKeyboardToWhatIsClickedRightAfterTheHostHasTakenIt)
+{
+    start();
+    m_user->moveTo(100, 52);
+    m_user->click();
+    ASSERT_TRUE(turnUntil([this] { return m_content->field.hasKeyboardFocus(true); }));
+
+    for (juce::TextEditor* const clicked : {&m_content->second, &m_content->field}) {
+        m_user->setFocus(reinterpret_cast<std::uintptr_t>(m_window->native()->parent()));
+        m_user->moveTo(100, clicked == &m_content->second ? 82 : 52);
+        m_user->click();
+        ASSERT_TRUE(turnUntil([&] { return clicked->hasKeyboardFocus(true); }));
+        turn(5);
+        m_user->press('b');
+        EXPECT_TRUE(turnUntil([&] { return clicked->getText() == "b"; }));
+    }
+    m_user->press(XK_Tab);
+    EXPECT_TRUE(turnUntil([this] { return m_content->second.hasKeyboardFocus(true); })) << "It can still be reached.";
+}
+
 TEST_F(JuceGuiAdapterTest, FollowsTheSizeOfTheHost)
 {
     start();
@@ -713,6 +734,17 @@ TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerWhereTheHostGivesNoMorePixels)
     EXPECT_EQ(m_view->getLocalBounds(), juce::Rectangle<int>(0, 0, 650, 375));
     EXPECT_EQ(m_content->getLocalBounds(), juce::Rectangle<int>(0, 0, 1300, 750));
     EXPECT_EQ(m_view->getLocalArea(m_content, m_content->getLocalBounds()), juce::Rectangle<int>(0, 0, 650, 375));
+}
+
+TEST_F(JuceGuiAdapterTest, PaintsWhatTheContentLeavesFree)
+{
+    startServer();
+    makeView();
+    m_content->setVisible(false);
+    const juce::Image image = m_view->createComponentSnapshot(m_view->getLocalBounds());
+
+    EXPECT_EQ(image.getPixelAt(0, 0), juce::Colour(0xff070c10));
+    EXPECT_EQ(image.getPixelAt(1299, 749), juce::Colour(0xff070c10));
 }
 
 TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerOnAFineScreenWithoutAFrame)
