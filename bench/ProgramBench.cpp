@@ -234,6 +234,87 @@ std::vector<std::string> planCommand(const std::string& program, const std::file
             stem + ".edl", "-o",    stem + "_new.stage", "--overwrite", "--summary"};
 }
 
+/// 200 tracks of 2,000 regions in two hours, with all that Ardour writes of each.
+void writeLargeSession(const std::string& path)
+{
+    constexpr int TrackCount = 200;
+    constexpr int RegionCount = 2000;
+    constexpr long Frame = 48'000 / 24;
+    constexpr long Distance = 90 * Frame;
+    constexpr long Length = 80 * Frame;
+    const auto time = [](long samples) { return std::string("a").append(std::to_string(samples * 5880)); };
+    std::ofstream file(path);
+    file << R"(<?xml version="1.0" encoding="UTF-8"?>
+<Session version="7002" name="large" sample-rate="48000" id-counter="9000000">
+  <Config>
+    <Option name="timecode-format" value="timecode_24"/>
+  </Config>
+  <Sources>
+)";
+    for (int track = 0; track < TrackCount; ++track)
+        file << "    <Source name=\"a" << track << R"(.wav" type="audio" id=")" << 100 + track
+             << "\" channel=\"0\"/>\n";
+    file << "  </Sources>\n  <Locations>\n    <Location id=\"5\" name=\"session\" start=\"a0\" end=\""
+         << time(RegionCount * Distance) << "\" flags=\"IsSessionRange\"/>\n  </Locations>\n  <Routes>\n";
+    for (int track = 0; track < TrackCount; ++track)
+        file << "    <Route id=\"" << 1000 + track << "\" name=\"T" << track
+             << R"(" default-type="audio" audio-playlist=")" << 2000 + track << "\"/>\n";
+    file << "  </Routes>\n  <Playlists>\n";
+    int id = 10'000;
+    for (int track = 0; track < TrackCount; ++track) {
+        file << "    <Playlist id=\"" << 2000 + track << "\" name=\"T" << track << "\" type=\"audio\">\n";
+        for (int region = 0; region < RegionCount; ++region) {
+            const std::string start = time(region % 50 * 100L);
+            file << "      <Region name=\"r" << track << "." << region
+                 << R"(" muted="0" opaque="1" locked="0" video-locked="0" automatic="0" whole-file="0" import="0" )"
+                    R"(external="0" sync-marked="0" left-of-split="0" right-of-split="0" hidden="0" )"
+                    R"(position-locked="0" valid-transients="0" start=")"
+                 << start << R"(" length=")" << time(Length) << "@" << time(region * Distance + track * 77L)
+                 << R"(" sync-position=")" << start
+                 << R"(" ancestral-start="a0" ancestral-length="a0@a0" stretch="1" shift="1" layering-index=")"
+                 << region
+                 << R"(" tags="" contents="0" envelope-active="0" default-fade-in="1" default-fade-out="1" )"
+                    R"(fade-in-active="1" fade-out-active="1" scale-amplitude="1" id=")"
+                 << id++ << R"(" type="audio" first-edit="nothing" source-0=")" << 100 + track
+                 << R"(" master-source-0=")" << 100 + track << R"(" channels="1">
+        <Envelope default="yes"/>
+        <FadeIn default="yes"/>
+        <FadeOut default="yes"/>
+      </Region>
+)";
+        }
+        file << "    </Playlist>\n";
+    }
+    file << "  </Playlists>\n</Session>\n";
+    if (!file.flush())
+        throw std::runtime_error("Cannot write " + path);
+}
+
+/// Carries such a session over to a cut in which a quarter of the shots have changed places.
+Measured applyToLargeSession(const std::string& program, const std::filesystem::path& folder)
+{
+    const std::string stem = (folder / "large").string();
+    std::mt19937 random(1);
+    Cut oldCut;
+    for (std::uint32_t frames = 0; frames < 2000 * 90; frames += oldCut.back().length)
+        oldCut.push_back(
+            {static_cast<std::uint32_t>(oldCut.size()), 86'400, static_cast<std::uint32_t>(60 + random() % 340)});
+    Cut newCut = oldCut;
+    for (std::size_t change = 0; change < oldCut.size() / 4; ++change) {
+        const std::size_t shot = random() % (oldCut.size() - 1);
+        std::swap(newCut[shot], newCut[shot + 1]);
+    }
+    newCut.erase(newCut.begin() + 5, newCut.begin() + 9);
+    writeEdl(stem + "_old.edl", oldCut);
+    writeEdl(stem + "_new.edl", newCut);
+    writeLargeSession(stem + ".ardour");
+    const Measured measured = measure({program, "apply", stem + ".ardour", "--old", stem + "_old.edl", "--new",
+                                       stem + "_new.edl", "-o", stem + "_new.ardour", "--overwrite", "--summary"});
+    std::filesystem::remove(stem + ".ardour");
+    std::filesystem::remove(stem + "_new.ardour");
+    return measured;
+}
+
 bool run(const std::string& program, const std::filesystem::path& folder)
 {
     std::filesystem::create_directories(folder);
@@ -274,6 +355,9 @@ bool run(const std::string& program, const std::filesystem::path& folder)
             applyToManyClips(program, folder, {"--notes", (folder / ("many" + extension)).string()});
         kept &= report(what.c_str(), withNotes / withoutNotes, 1.3, "x");
     }
+    const Measured session = applyToLargeSession(program, folder);
+    kept &= report("apply, a session of 200 tracks of 2,000 regions", session.seconds, 15, "s");
+    kept &= report("the same, most memory", session.megabytes, 2000, "MB");
     kept &= report("list --summary of 1,000,000 events, most memory", megabytes, 900, "MB");
     return kept;
 }

@@ -182,6 +182,8 @@ void HostedProject::requireTarget(const std::string& file) const
 
 void HostedProject::save(const std::string& file, const std::optional<util::FileStamp>& expected)
 {
+    // Nobody takes the run back any more, and what the project was takes more memory than what it is.
+    m_project->undoList().clear();
     try {
         m_application.saveProject(*m_project, file, expected);
     } catch (const ProjectFileChanged&) {

@@ -49,7 +49,8 @@ std::vector<std::u16string> Boxes::chooseFiles(const FileQuestion& question)
         enum { Yes, Cancel };
         return ask("Save", text, {yes, "Cancel"}, Cancel) == Yes;
     };
-    FileBox box(question, m_folders.startOf(standin::toUtf8(question.folder)), askBack);
+    const auto tell = [this](const juce::String& text) { ask("Cadrel", text, {"OK"}, 0); };
+    FileBox box(question, m_folders.startOf(standin::toUtf8(question.folder)), askBack, tell);
     run(box);
     std::vector<std::u16string> files;
     for (const std::filesystem::path& file : box.files())

@@ -40,9 +40,10 @@ juce::File fileOf(const std::filesystem::path& path)
 
 } // namespace
 
-FileBox::FileBox(const standin::UserBoxes::FileQuestion& question, const std::filesystem::path& folder, AskBack askBack)
+FileBox::FileBox(const standin::UserBoxes::FileQuestion& question, const std::filesystem::path& folder, AskBack askBack,
+                 Tell tell)
     : Box("File Box", toJuce(question.title)), FileFilter(describe(question.filters)), m_filters(question.filters),
-      m_isSave(question.isSave), m_askBack(std::move(askBack)),
+      m_isSave(question.isSave), m_askBack(std::move(askBack)), m_tell(std::move(tell)),
       m_browser(flagsOf(question.isSave), fileOf(folder), this, nullptr), m_accept(question.isSave ? "Save" : "Open")
 {
     m_browser.addListener(this);
@@ -166,6 +167,8 @@ void FileBox::open()
     }
     if (!m_files.empty())
         setDone();
+    else if (typed != juce::File())
+        m_tell("There is no file " + typed.getFullPathName() + ".");
 }
 
 void FileBox::save()
@@ -179,8 +182,10 @@ void FileBox::save()
     }
     const std::filesystem::path file = withExtension(pathOf(typed), m_filters);
     const juce::File target = fileOf(file);
-    if (target.isDirectory() || !target.getParentDirectory().isDirectory())
-        return;
+    if (target.isDirectory())
+        return m_tell("\"" + target.getFileName() + "\" is a folder. Choose another name.");
+    if (!target.getParentDirectory().isDirectory())
+        return m_tell("There is no folder " + target.getParentDirectory().getFullPathName() + ".");
     if (target.existsAsFile() &&
         !m_askBack("\"" + target.getFileName() + "\" exists already. Overwrite it?", "Overwrite"))
         return;

@@ -18,8 +18,11 @@ class FileBox : public Box, private juce::FileBrowserListener, private juce::Fil
 public:
     /// Asks the user a question over this box and answers whether he says yes. The last text is the label of that button.
     using AskBack = std::function<bool(const juce::String& question, const juce::String& yes)>;
+    /// Tells the user something over this box.
+    using Tell = std::function<void(const juce::String& message)>;
 
-    FileBox(const standin::UserBoxes::FileQuestion& question, const std::filesystem::path& folder, AskBack askBack);
+    FileBox(const standin::UserBoxes::FileQuestion& question, const std::filesystem::path& folder, AskBack askBack,
+            Tell tell);
     ~FileBox() override;
 
     /// None when he has cancelled.
@@ -49,6 +52,7 @@ private:
     FileFilters m_filters;
     bool m_isSave;
     AskBack m_askBack;
+    Tell m_tell;
     juce::FileBrowserComponent m_browser;
     juce::TextEditor* m_name = nullptr;                        ///< in the browser
     juce::DirectoryContentsDisplayComponent* m_list = nullptr; ///< in the browser

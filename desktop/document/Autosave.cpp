@@ -104,6 +104,18 @@ Autosave parsed(std::string file)
     return autosave;
 }
 
+void replace(const fs::path& file, std::string_view header, std::string_view content)
+{
+    try {
+        FileReplacement replacement(file);
+        replacement.write(header);
+        replacement.write(content);
+        replacement.commit();
+    } catch (const cadrel::util::Result::Type&) {
+        throw DocumentError(file.string() + ": the autosave can't be written");
+    }
+}
+
 /// Whether the file is an autosave, if not a whole one.
 bool beginsLikeOne(const fs::path& file)
 {
@@ -159,14 +171,7 @@ void Autosave::write(const fs::path& path, const ContentPrint& filePrint, std::s
     std::error_code error;
     if (fs::exists(fs::symlink_status(file, error)) && !isOurs(file))
         throw DocumentError(file.string() + ": is in the way of the autosave; give it another name");
-    try {
-        FileReplacement replacement(file);
-        replacement.write(headerOf(path, filePrint, content, time));
-        replacement.write(content);
-        replacement.commit();
-    } catch (const cadrel::util::Result::Type&) {
-        throw DocumentError(file.string() + ": the autosave can't be written");
-    }
+    replace(file, headerOf(path, filePrint, content, time), content);
 }
 
 void Autosave::remove(const fs::path& project)
@@ -177,17 +182,30 @@ void Autosave::remove(const fs::path& project)
         fs::remove(file, error);
 }
 
-void Autosave::keepAside(const fs::path& project)
+std::optional<fs::path> Autosave::keepAside(const fs::path& project)
 {
     const fs::path file = pathFor(project);
     std::error_code error;
-    for (int number = 1; isOurs(file); ++number) {
-        const fs::path aside = fileBeside(project, "", std::string(".autosave-").append(std::to_string(number)));
-        if (fs::exists(fs::symlink_status(aside, error)))
-            continue;
-        fs::rename(file, aside, error);
-        return;
+    if (!isOurs(file))
+        return std::nullopt;
+    const fs::path aside = asidePathFor(project);
+    fs::rename(file, aside, error);
+    return error ? std::nullopt : std::optional(aside);
+}
+
+fs::path Autosave::asidePathFor(const fs::path& project)
+{
+    for (int number = 1;; ++number) {
+        fs::path aside = fileBeside(project, "", std::string(".autosave-").append(std::to_string(number)));
+        std::error_code error;
+        if (!fs::exists(fs::symlink_status(aside, error)))
+            return aside;
     }
+}
+
+void Autosave::writeAside(const fs::path& path, const ContentPrint& filePrint, std::string_view content, Time time)
+{
+    replace(asidePathFor(path), headerOf(path, filePrint, content, time), content);
 }
 
 } // namespace desktop

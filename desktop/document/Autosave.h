@@ -41,9 +41,14 @@ struct Autosave {
                       Time time);
     /// Does nothing where another file has its name.
     static void remove(const std::filesystem::path& project);
-    /// Gives it a name under which nobody looks for it or replaces it, `reel3.stage.autosave-1`. Does nothing where there is
-    /// none, and where the disk refuses that.
-    static void keepAside(const std::filesystem::path& project);
+    /// Gives it a name under which nobody looks for it or replaces it, `reel3.stage.autosave-1`. Answers its new path; nothing
+    /// where there is none, and where the disk refuses that.
+    static std::optional<std::filesystem::path> keepAside(const std::filesystem::path& project);
+    /// The first such name that is free.
+    static std::filesystem::path asidePathFor(const std::filesystem::path& project);
+    /// Writes one under such a name, and leaves the one of the project as it is. Throws DocumentError.
+    static void writeAside(const std::filesystem::path& path, const ContentPrint& filePrint, std::string_view content,
+                           Time time);
 };
 
 } // namespace desktop

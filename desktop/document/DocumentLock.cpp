@@ -66,6 +66,25 @@ bool isStillAt(int descriptor, const fs::path& path)
            open.st_dev == named.st_dev;
 }
 
+struct LockFile {
+    int descriptor = -1;
+    bool isNew = false;       ///< it wasn't there before
+    bool hasVanished = false; ///< between two looks
+};
+
+LockFile openLockFile(const fs::path& path)
+{
+    constexpr int Flags = O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK;
+    const int made = ::open(path.c_str(), O_RDWR | O_CREAT | O_EXCL | Flags, ReadableAndWritable);
+    if (made >= 0)
+        return {made, true, false};
+    const bool isThere = errno == EEXIST;
+    int descriptor = ::open(path.c_str(), O_RDWR | Flags);
+    if (descriptor < 0)
+        descriptor = ::open(path.c_str(), O_RDONLY | Flags); // another user's
+    return {descriptor, false, isThere && descriptor < 0 && errno == ENOENT};
+}
+
 } // namespace
 
 DocumentLock::DocumentLock(const fs::path& file) : m_path(pathFor(file))
@@ -78,19 +97,17 @@ DocumentLock::~DocumentLock()
 {
     if (!isHeld())
         return;
-    // First, so that nobody else holds what is removed.
-    ::unlink(m_path.c_str());
+    // First, so that nobody else holds what is removed. Whoever has removed ours may have let another program make its own.
+    if (isStillAt(m_descriptor, m_path))
+        ::unlink(m_path.c_str());
     ::close(m_descriptor);
 }
 
 bool DocumentLock::take()
 {
-    constexpr int Flags = O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK;
-    int descriptor = ::open(m_path.c_str(), O_RDWR | O_CREAT | Flags, ReadableAndWritable);
+    const auto [descriptor, isNew, hasVanished] = openLockFile(m_path);
     if (descriptor < 0)
-        descriptor = ::open(m_path.c_str(), O_RDONLY | Flags); // another user's
-    if (descriptor < 0)
-        return true;
+        return !hasVanished;
     if (!isOrdinary(descriptor)) {
         ::close(descriptor);
         return true;
@@ -98,6 +115,10 @@ bool DocumentLock::take()
     if (::flock(descriptor, LOCK_EX | LOCK_NB) != 0) {
         if (errno == EWOULDBLOCK)
             m_holder = readHolder(descriptor);
+        else
+            m_isUnknown = true;
+        if (m_isUnknown && isNew)
+            ::unlink(m_path.c_str());
         ::close(descriptor);
         return true;
     }
@@ -132,6 +153,7 @@ void DocumentLock::swap(DocumentLock& other) noexcept
 {
     std::swap(m_path, other.m_path);
     std::swap(m_descriptor, other.m_descriptor);
+    std::swap(m_isUnknown, other.m_isUnknown);
     std::swap(m_holder, other.m_holder);
 }
 

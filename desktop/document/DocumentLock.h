@@ -11,6 +11,9 @@ namespace desktop {
 
 /// Keeps other programs from taking a project for one that nobody has open: a hidden file beside it that this process holds
 /// locked. The system drops the lock when the process ends in whatever way, so what a crash leaves holds nobody up.
+///
+/// On a disk without locks it can't be told whether another program has the project open. It counts as open here alone then,
+/// and no file stays.
 class DocumentLock {
 public:
     /// Who holds a lock.
@@ -21,7 +24,8 @@ public:
 
     /// Holds nothing.
     DocumentLock() = default;
-    /// Takes the lock of the file, unless another has it. Where the folder lets no file be made, nothing is locked.
+    /// Takes the lock of the file, unless another has it. Where the folder lets no file be made, or the disk knows no locks,
+    /// nothing is locked.
     explicit DocumentLock(const std::filesystem::path& file);
     DocumentLock(DocumentLock&& other) noexcept { swap(other); }
     DocumentLock& operator=(DocumentLock&& other) noexcept
@@ -30,10 +34,12 @@ public:
         swap(taken);
         return *this;
     }
-    /// Gives it up and removes the file.
+    /// Gives it up and removes the file, unless that is another's by now.
     ~DocumentLock();
 
     bool isHeld() const { return m_descriptor >= 0; }
+    /// Whether nobody else is known to have the project open, and the folder takes files: it is held, or can't be.
+    bool isOurs() const { return isHeld() || m_isUnknown; }
     /// The other process that has the lock.
     const std::optional<Holder>& holder() const { return m_holder; }
 
@@ -48,6 +54,7 @@ private:
 
     std::filesystem::path m_path;
     int m_descriptor = -1;
+    bool m_isUnknown = false; ///< the disk knows no locks
     std::optional<Holder> m_holder;
 };
 

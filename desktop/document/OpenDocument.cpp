@@ -4,6 +4,7 @@
 
 #include "desktop/document/Autosave.h"
 #include "desktop/document/DocumentError.h"
+#include "desktop/document/FileWords.h"
 #include "standin/Application.h"
 #include "standin/edit/EditService.h"
 #include "standin/file/ProjectFile.h"
@@ -11,6 +12,8 @@
 #include "util/WriteObstacle.h"
 
 #include <algorithm>
+#include <exception>
+#include <new>
 #include <system_error>
 #include <utility>
 
@@ -50,17 +53,6 @@ SaveAnswer answerTo(StoredFile::State state, const fs::path& file)
     }
 }
 
-/// Why a project couldn't be written. What the file system says tells more than that it couldn't.
-std::string failureOf(const fs::path& file, const ProjectFileError& error)
-{
-    const std::string fault = error.what();
-    if (!fault.ends_with(": can't be written"))
-        return fault;
-    if (const auto obstacle = cadrel::util::WriteObstacle::of(file))
-        return file.string() + ": " + obstacle->problem;
-    return fault + "; see whether the disk is full";
-}
-
 } // namespace
 
 OpenDocument::OpenDocument(std::uint64_t id, standin::Application& application, standin::Project& project,
@@ -70,11 +62,11 @@ OpenDocument::OpenDocument(std::uint64_t id, standin::Application& application, 
       m_mark(recovery ? UnsavedMark(project, m_file.print()) : UnsavedMark(project)), m_timer(std::move(timer))
 {
     // The one from which it was opened.
-    if (recovery && m_lock.isHeld())
+    if (recovery && m_lock.isOurs())
         m_autosavedVersion = m_mark.version();
     if (recovery && recovery->basis != m_file.print())
         m_formerBasis = recovery->basis;
-    if (!m_lock.isHeld() && !m_lock.holder())
+    if (!m_lock.isOurs() && !m_lock.holder())
         m_autosaveFault = path().parent_path().string() + ": no autosave can be written into this folder";
 }
 
@@ -131,8 +123,10 @@ SaveAnswer OpenDocument::overwrite()
 
 SaveAnswer OpenDocument::saveAs(const fs::path& path)
 {
-    if (path == this->path())
-        return overwrite();
+    if (path == this->path()) {
+        SaveAnswer answer = save();
+        return answer.state == State::Missing ? overwrite() : answer;
+    }
     DocumentLock lock(path);
     if (lock.holder())
         return {State::Failed, path.string() + ": is open in another window"};
@@ -141,10 +135,10 @@ SaveAnswer OpenDocument::saveAs(const fs::path& path)
     if (!answer.isSaved())
         return answer;
     // The lock tells whose the autosave beside the former file is.
-    if (m_lock.isHeld())
+    if (m_lock.isOurs())
         Autosave::remove(former);
     m_lock = std::move(lock);
-    if (m_lock.isHeld())
+    if (m_lock.isOurs())
         Autosave::keepAside(path);
     return answer;
 }
@@ -172,44 +166,77 @@ SaveAnswer OpenDocument::write(const fs::path& path, const std::optional<FileSta
     }
 }
 
-void OpenDocument::idle(Clock::time_point now, Clock::duration interval)
+void OpenDocument::idle(Clock::time_point now, Clock::duration interval, Modules modules)
 {
     if (isWithinTransaction())
         return;
     const Clock::duration pause = std::max<Clock::duration>(ShortestLookInterval, LookShare * m_lookCost);
     if (!m_lookedAt || now - *m_lookedAt >= pause) {
         const auto start = m_timer();
-        m_mark.look(now);
+        look(now, modules);
         m_lookCost = m_timer() - start;
         m_lookedAt = now;
         if (m_lock.holder())
             retakeLock();
     }
-    if (!m_lock.isHeld())
+    if (!m_lock.isOurs())
         return;
     if (!m_mark.isSet())
         return dropAutosave();
-    const Clock::duration wait = std::max(interval, AutosaveShare * m_autosaveCost);
-    if (m_autosavedVersion != m_mark.version() && (!m_autosavedAt || now - *m_autosavedAt >= wait))
-        autosave(now);
+    const auto isPast = [now](const std::optional<Clock::time_point>& time, Clock::duration wait) {
+        return !time || now - *time >= wait;
+    };
+    if (!hasPresentAutosave() && isPast(m_autosavedAt, interval) &&
+        isPast(m_autosaveTriedAt, AutosaveShare * m_autosaveCost))
+        autosave(now, modules);
+}
+
+void OpenDocument::look(Clock::time_point now, Modules modules)
+{
+    if (modules == Modules::Ask)
+        m_mark.look(now);
+    else
+        m_mark.lookWithoutModules();
+}
+
+void OpenDocument::leave(Modules modules)
+try {
+    look(m_timer(), modules);
+    if (m_lock.isOurs() && !isWithinTransaction() && m_mark.isSet() && !hasPresentAutosave())
+        autosave(m_timer(), modules);
+    m_lock = DocumentLock();
+} catch (const std::exception&) {
+    // Such as no memory. An earlier autosave stays, and the program ends.
+}
+
+void OpenDocument::keepUnsavedAside()
+try {
+    if (settleUnsaved())
+        Autosave::writeAside(path(), m_formerBasis.value_or(m_file.print()), m_mark.takeText(),
+                             std::chrono::system_clock::now());
+} catch (const ProjectFileError& error) {
+    throw DocumentError(path().string() + ": " + wordsOf(error));
 }
 
 /// The other process may have closed the project, or ended and left unsaved work.
 void OpenDocument::retakeLock()
 {
     m_lock = DocumentLock(path());
-    if (m_lock.isHeld())
-        Autosave::keepAside(path());
+    if (m_lock.isOurs())
+        m_workOfOther = Autosave::keepAside(path());
 }
 
-void OpenDocument::autosave(Clock::time_point now)
+void OpenDocument::autosave(Clock::time_point now, Modules modules)
 {
-    m_autosavedAt = now;
+    m_autosaveTriedAt = now;
     const auto start = m_timer();
     try {
-        const std::string text = m_mark.takeText();
-        if (!m_mark.isSet())
+        const std::string text = modules == Modules::Ask ? m_mark.takeText() : m_mark.takeTextAsItIs();
+        if (!m_mark.isSet()) {
+            m_autosaveCost = m_timer() - start;
             return dropAutosave();
+        }
+        m_autosavedAt = now;
         const std::uint64_t version = m_mark.version();
         Autosave::write(path(), m_formerBasis.value_or(m_file.print()), text, std::chrono::system_clock::now());
         // What couldn't be written is tried again after the interval.
@@ -217,8 +244,10 @@ void OpenDocument::autosave(Clock::time_point now)
         m_autosaveFault.clear();
     } catch (const DocumentError& error) {
         m_autosaveFault = error.what();
+    } catch (const std::bad_alloc&) {
+        m_autosaveFault = path().string() + ": there isn't enough memory for an autosave";
     } catch (const ProjectFileError& error) {
-        m_autosaveFault = path().string().append(": ").append(error.what());
+        m_autosaveFault = path().string().append(": ").append(wordsOf(error));
     }
     m_autosaveCost = m_timer() - start;
 }
@@ -228,6 +257,21 @@ void OpenDocument::dropAutosave()
     if (m_autosavedVersion)
         Autosave::remove(path());
     m_autosavedVersion.reset();
+}
+
+std::string OpenDocument::failureOf(const fs::path& file, const ProjectFileError& error)
+{
+    const std::string fault = error.what();
+    if (!fault.ends_with(": can't be written"))
+        return wordsOf(error);
+    // What the file system says tells more than that it couldn't.
+    if (const auto obstacle = cadrel::util::WriteObstacle::of(file))
+        return file.string() + ": " + obstacle->problem + "; " + obstacle->remedy;
+    std::string words = fault + "; see whether the disk is full, or save it on another disk with Save As";
+    m_mark.lookWithoutModules();
+    if (hasPresentAutosave())
+        words += ". Until then the work is kept in " + Autosave::pathFor(path()).string();
+    return words;
 }
 
 bool OpenDocument::isWithinTransaction() const

@@ -15,11 +15,13 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace standin {
 class Application;
 class Project;
+class ProjectFileError;
 } // namespace standin
 
 namespace desktop {
@@ -72,6 +74,8 @@ public:
     StoredFile::State fileState() { return m_file.look(); }
     /// Why the last autosave couldn't be written, in one line; empty as long as they can.
     const std::string& autosaveFault() const { return m_autosaveFault; }
+    /// Where the unsaved work of another program is, which had the project open as well and has ended; answered once.
+    std::optional<std::filesystem::path> takeWorkOfOther() { return std::exchange(m_workOfOther, std::nullopt); }
 
     // The undo list, the oldest entry first.
 
@@ -85,6 +89,7 @@ public:
 private:
     friend class OpenDocuments;
     using Timer = std::function<Clock::time_point()>;
+    enum class Modules { Ask, LeaveAlone };
 
     /// Of work that was opened from an autosave.
     struct Recovery {
@@ -103,10 +108,18 @@ private:
     SaveAnswer saveAs(const std::filesystem::path& path);
     SaveAnswer write(const std::filesystem::path& path, const std::optional<cadrel::util::FileStamp>& expected);
     /// What there is to do while the user does nothing. Autosaves at most once in `interval`.
-    void idle(Clock::time_point now, Clock::duration interval);
+    void idle(Clock::time_point now, Clock::duration interval, Modules modules);
+    void look(Clock::time_point now, Modules modules);
+    /// Writes unsaved work that has no autosave yet, and lets others open the project. Nothing is thrown.
+    void leave(Modules modules);
+    /// Writes unsaved work under a name of its own, where there is any. Throws DocumentError.
+    void keepUnsavedAside();
     void retakeLock();
-    void autosave(Clock::time_point now);
+    void autosave(Clock::time_point now, Modules modules);
     void dropAutosave();
+    bool hasPresentAutosave() const { return m_autosavedVersion == m_mark.version(); }
+    /// Why the project couldn't be written, and what the user can do.
+    std::string failureOf(const std::filesystem::path& file, const standin::ProjectFileError& error);
     bool isWithinTransaction() const;
 
     std::uint64_t m_id;
@@ -119,10 +132,12 @@ private:
     Timer m_timer;
     std::optional<Clock::time_point> m_lookedAt;
     Clock::duration m_lookCost{};
-    std::optional<Clock::time_point> m_autosavedAt;
+    std::optional<Clock::time_point> m_autosaveTriedAt;
+    std::optional<Clock::time_point> m_autosavedAt; ///< when there was something to write last
     Clock::duration m_autosaveCost{};
     std::optional<std::uint64_t> m_autosavedVersion; ///< nothing where there is no autosave of ours
     std::string m_autosaveFault;
+    std::optional<std::filesystem::path> m_workOfOther;
 };
 
 } // namespace desktop

@@ -3,6 +3,7 @@
 #include "desktop/document/OpenDocuments.h"
 
 #include "desktop/document/DocumentError.h"
+#include "desktop/document/FileWords.h"
 #include "desktop/document/RecentFiles.h"
 #include "standin/Application.h"
 #include "standin/edit/EditService.h"
@@ -37,7 +38,7 @@ fs::path projectAt(const fs::path& path)
 try {
     return realPath(ProjectFile::fileIn(path));
 } catch (const ProjectFileError& error) {
-    throw DocumentError(error.what());
+    throw DocumentError(wordsOf(error));
 }
 
 /// Nothing where there is no unsaved work, or none that the file doesn't have.
@@ -59,8 +60,8 @@ OpenDocuments::OpenDocuments(standin::Application& application, RecentFiles* rec
 
 OpenDocuments::~OpenDocuments()
 {
-    while (!m_documents.empty())
-        close(*m_documents.back());
+    for (const auto& document : m_documents)
+        m_application.closeProject(document->project());
 }
 
 Opening OpenDocuments::look(const fs::path& path) const
@@ -99,7 +100,7 @@ std::unique_ptr<OpenDocument> OpenDocuments::openedFrom(const fs::path& path, Wo
     StoredFile file(path);
     DocumentLock lock(path);
     // The unsaved work of a program that still has the project open is its own.
-    const std::optional<Autosave> kept = lock.isHeld() ? Autosave::read(path) : std::nullopt;
+    const std::optional<Autosave> kept = lock.isOurs() ? Autosave::read(path) : std::nullopt;
     const bool isWork = kept && ContentPrint::of(kept->content) != file.print();
     if (isWork && work == Work::Recover)
         return newDocument(++m_lastId, openProject(path, &kept->content), std::move(file), std::move(lock),
@@ -117,7 +118,7 @@ standin::Project& OpenDocuments::openProject(const fs::path& file, const std::st
 try {
     return content ? m_application.openProject(file, *content) : m_application.openProject(file);
 } catch (const ProjectFileError& error) {
-    throw DocumentError(error.what());
+    throw DocumentError(wordsOf(error));
 }
 
 std::unique_ptr<OpenDocument> OpenDocuments::newDocument(std::uint64_t id, standin::Project& project, StoredFile file,
@@ -135,6 +136,12 @@ OpenDocument& OpenDocuments::reload(OpenDocument& document)
     const fs::path path = document.path();
     StoredFile file(path);
     standin::Project& project = openProject(path, nullptr);
+    try {
+        document.keepUnsavedAside();
+    } catch (...) {
+        m_application.closeProject(project);
+        throw;
+    }
     document.dropAutosave();
     const auto place = placeOf(document);
     std::unique_ptr<OpenDocument> former = std::exchange(
@@ -203,10 +210,32 @@ try {
 
 void OpenDocuments::idle(Clock::time_point now)
 {
-    if (m_application.edits().isOpen() || m_application.idleManager().isBlocked())
+    idle(now, OpenDocument::Modules::Ask);
+}
+
+void OpenDocuments::idleBeneathBox(Clock::time_point now)
+{
+    idle(now, OpenDocument::Modules::LeaveAlone);
+}
+
+void OpenDocuments::idle(Clock::time_point now, OpenDocument::Modules modules)
+{
+    if (!isHostIdle())
         return;
     for (const auto& document : m_documents)
-        document->idle(now, m_autosaveInterval);
+        document->idle(now, m_autosaveInterval, modules);
+}
+
+void OpenDocuments::leave(bool mayAskModules)
+{
+    using Modules = OpenDocument::Modules;
+    for (const auto& document : m_documents)
+        document->leave(mayAskModules && isHostIdle() ? Modules::Ask : Modules::LeaveAlone);
+}
+
+bool OpenDocuments::isHostIdle() const
+{
+    return !m_application.edits().isOpen() && !m_application.idleManager().isBlocked();
 }
 
 OpenDocuments::Documents::iterator OpenDocuments::placeOf(const OpenDocument& document)

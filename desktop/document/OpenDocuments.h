@@ -62,7 +62,7 @@ public:
                            Clock::duration autosaveInterval = AutosaveInterval, Timer timer = &Clock::now);
     OpenDocuments(const OpenDocuments&) = delete;
     OpenDocuments& operator=(const OpenDocuments&) = delete;
-    /// Closes all, as `close` does.
+    /// Closes those that are still open, and drops nothing of their unsaved work: nobody has been asked about it.
     ~OpenDocuments();
 
     /// Looks at what a path means: a project, a folder with one session, or a link. Throws DocumentError.
@@ -70,8 +70,8 @@ public:
     /// Opens the project and activates it; one that is open is only activated. Throws DocumentError, and nothing is opened
     /// then.
     OpenDocument& open(const std::filesystem::path& path, Work work = Work::Keep);
-    /// Opens the file anew in place of the document, whose unsaved work is lost. Answers the new document, which has the same
-    /// tab. Throws DocumentError, and the document stays as it is then.
+    /// Opens the file anew in place of the document, whose unsaved work is kept as the file that Autosave::asidePathFor names.
+    /// Answers the new document, which has the same tab. Throws DocumentError, and the document stays as it is then.
     OpenDocument& reload(OpenDocument& document);
     /// Closes it and drops its unsaved work. If it was active, the one after it becomes so, or the one before.
     void close(OpenDocument& document);
@@ -97,6 +97,11 @@ public:
     /// Call it now and then while the user does nothing: looks what the modules have changed, and autosaves. It does nothing
     /// within a transaction and while idle calls are blocked.
     void idle(Clock::time_point now = Clock::now());
+    /// The same while a box is open: no module is called, and what they have stored the last time is autosaved.
+    void idleBeneathBox(Clock::time_point now = Clock::now());
+    /// For a program that has to end at once: writes the unsaved work of all documents that isn't kept yet, and lets other
+    /// programs open them. Nothing is thrown. While a box is open no module may be asked for what it has.
+    void leave(bool mayAskModules);
 
 private:
     using Documents = std::vector<std::unique_ptr<OpenDocument>>;
@@ -106,6 +111,8 @@ private:
     standin::Project& openProject(const std::filesystem::path& file, const std::string* content);
     std::unique_ptr<OpenDocument> newDocument(std::uint64_t id, standin::Project& project, StoredFile file,
                                               DocumentLock lock, const std::optional<OpenDocument::Recovery>& recovery);
+    void idle(Clock::time_point now, OpenDocument::Modules modules);
+    bool isHostIdle() const;
     Documents::iterator placeOf(const OpenDocument& document);
 
     standin::Application& m_application;

@@ -27,6 +27,8 @@ public:
     static std::filesystem::path defaultFile();
 
     std::vector<Entry> entries() const;
+    /// The same without a look at any of the files, each of which may be on a disk that doesn't answer.
+    std::vector<std::filesystem::path> paths() const { return read(); }
     /// Puts it first. False where it can't be kept, as for a name that is no UTF-8 text.
     bool add(const std::filesystem::path& path);
     bool remove(const std::filesystem::path& path);

@@ -62,6 +62,12 @@ void UnsavedMark::look(Clock::time_point now)
         compare();
 }
 
+void UnsavedMark::lookWithoutModules()
+{
+    if (!m_project.log().isOpen())
+        advance();
+}
+
 void UnsavedMark::settle()
 {
     if (m_project.log().isOpen())
@@ -81,6 +87,11 @@ void UnsavedMark::settle()
 std::string UnsavedMark::takeText()
 {
     announce();
+    return takeTextAsItIs();
+}
+
+std::string UnsavedMark::takeTextAsItIs()
+{
     advance();
     return textHere();
 }

@@ -36,11 +36,15 @@ public:
     /// Lets the modules store what they have, and looks again. It compares bytes only if that takes little time compared with
     /// how long nothing has changed. Not while a transaction is open.
     void look(Clock::time_point now);
-    /// The same, and exact.
+    /// Looks only where the project stands; no module is asked, and no bytes are compared.
+    void lookWithoutModules();
+    /// As `look`, and exact.
     void settle();
 
     /// The bytes with which the project would be stored now; what they tell counts for the mark. Throws ProjectFileError.
     std::string takeText();
+    /// The same with what the modules have stored the last time; they aren't asked.
+    std::string takeTextAsItIs();
     /// These bytes of the project have just been stored.
     void wasStored(const ContentPrint& print);
     /// The same number as long as the project's bytes are known to be the same.

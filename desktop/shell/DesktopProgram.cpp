@@ -33,7 +33,8 @@ fs::path homeFolder()
 } // namespace
 
 DesktopProgram::DesktopProgram(const ModulePlaces& places)
-    : m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
+    : m_window(WindowMemory(WindowMemory::defaultFile())),
+      m_boxes(m_loop, m_window.view(), m_window.view().desk(), homeFolder()), m_application({}, &m_videos),
       m_documents(m_application, &m_recent), m_workspace(m_documents, m_boxes), m_stills(m_application.context())
 {
     MainView& view = m_window.view();
@@ -51,6 +52,7 @@ DesktopProgram::DesktopProgram(const ModulePlaces& places)
     m_application.views().setWindowSystem(&view.embedded());
     m_loop.setIdle([this](bool isWaiting) { idle(isWaiting); });
     loadModule(places);
+    m_missingRecent.look(m_recent.paths());
 }
 
 DesktopProgram::~DesktopProgram()
@@ -76,33 +78,40 @@ void DesktopProgram::run(const std::vector<fs::path>& projects)
 {
     later([=, this] { open(projects); });
     m_loop.runUntil([this] { return m_isDone; });
+    m_window.keepForm();
 }
 
 void DesktopProgram::idle(bool isWaiting)
 {
     // While something waits for the user, the host isn't idle, but views of modules go on working.
-    if (isWaiting || m_boxes.isOpen()) {
+    const bool isHostIdle = !isWaiting && !m_boxes.isOpen();
+    endIfAsked(isHostIdle);
+    const auto now = std::chrono::steady_clock::now();
+    if (!isHostIdle) {
         m_application.views().idle();
+        m_documents.idleBeneathBox(now);
         return;
     }
-    doActs();
+    m_acts.run([this](const std::string& fault) { m_workspace.tell(fault); });
     m_application.idle();
-    const auto now = std::chrono::steady_clock::now();
     m_documents.idle(now);
     if (now >= m_nextLook) {
         m_workspace.lookAtFile();
         m_workspace.lookAtAutosaves();
+        m_window.keepForm();
         m_nextLook = std::chrono::steady_clock::now() + LookInterval;
     }
     refresh();
     refreshTracks();
 }
 
-void DesktopProgram::doActs()
+void DesktopProgram::endIfAsked(bool isHostIdle)
 {
-    // What comes meanwhile is done in the next idle time.
-    for (const auto& act : std::exchange(m_acts, {}))
-        act();
+    const int signal = EndSignals::received();
+    if (signal == 0)
+        return;
+    m_documents.leave(isHostIdle);
+    EndSignals::endBy(signal);
 }
 
 void DesktopProgram::choose(int command)
@@ -123,6 +132,9 @@ void DesktopProgram::choose(int command)
         return invoke(IActionManager::Undo);
     case MenuCommand::Redo:
         return invoke(IActionManager::Redo);
+    case MenuCommand::ClearRecent:
+        m_recent.clear();
+        return;
     case MenuCommand::Keys:
         return showKeys();
     case MenuCommand::About:
@@ -174,9 +186,8 @@ void DesktopProgram::chooseModuleCommand(std::size_t index)
 
 void DesktopProgram::openRecent(std::size_t index)
 {
-    const auto entries = m_recent.entries();
-    if (index < entries.size())
-        open({entries[index].path});
+    if (index < m_listedRecent.size() && m_workspace.openRecent(m_recent, fs::path(m_listedRecent[index])))
+        showModuleWindow();
 }
 
 void DesktopProgram::takeDropped(const std::vector<fs::path>& files, juce::Point<int> place)
@@ -200,7 +211,10 @@ void DesktopProgram::takeDropped(const std::vector<fs::path>& files, juce::Point
 void DesktopProgram::passLists(const std::vector<std::string>& files, juce::Point<int> place)
 {
     EmbeddedView& embedded = m_window.view().embedded();
-    if (!embedded.drop(files, embedded.getLocalPoint(&m_window.view(), place)))
+    if (!m_documents.active())
+        m_workspace.tell(
+            "Open the project first, or drop it here. Then drop EDLs on the Old EDL, New EDL or Change EDL table.");
+    else if (!embedded.drop(files, embedded.getLocalPoint(&m_window.view(), place)))
         m_workspace.tell("Drop EDLs on the Old EDL, New EDL or Change EDL table.");
 }
 
@@ -300,13 +314,23 @@ std::vector<standin::MenuRegistry::Command> DesktopProgram::moduleCommands()
     return commands;
 }
 
+std::vector<MenuState::Recent> DesktopProgram::recentFiles()
+{
+    m_listedRecent = m_recent.paths();
+    std::vector<MenuState::Recent> files;
+    for (const fs::path& path : m_listedRecent)
+        files.push_back({path.string(), m_missingRecent.isMissing(path)});
+    // For the next time that the menu is opened.
+    m_missingRecent.look(m_listedRecent);
+    return files;
+}
+
 MenuState DesktopProgram::menuState()
 {
     MenuState state;
     for (const auto& command : moduleCommands())
         state.moduleCommands.push_back(command.title);
-    for (const RecentFiles::Entry& entry : m_recent.entries())
-        state.recentFiles.push_back(entry.path.string());
+    state.recentFiles = recentFiles();
     if (const OpenDocument* const active = m_documents.active()) {
         state.hasProject = true;
         state.undoNames = active->undoNames();

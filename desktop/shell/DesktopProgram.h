@@ -6,7 +6,10 @@
 #include "desktop/boxes/EventLoop.h"
 #include "desktop/document/OpenDocuments.h"
 #include "desktop/document/RecentFiles.h"
+#include "desktop/shell/ActQueue.h"
+#include "desktop/shell/EndSignals.h"
 #include "desktop/shell/MainWindow.h"
+#include "desktop/shell/MissingFiles.h"
 #include "desktop/shell/ModulePlaces.h"
 #include "desktop/shell/ProjectTracks.h"
 #include "desktop/shell/Workspace.h"
@@ -17,7 +20,6 @@
 
 #include <chrono>
 #include <filesystem>
-#include <functional>
 #include <map>
 #include <memory>
 #include <optional>
@@ -42,8 +44,9 @@ private:
     void loadModule(const ModulePlaces& places);
     void idle(bool isWaiting);
     /// Does it in the next idle time, out of the calls of JUCE, so that a box may wait in it.
-    void later(std::function<void()> act) { m_acts.push_back(std::move(act)); }
-    void doActs();
+    void later(ActQueue::Act act) { m_acts.add(std::move(act)); }
+    /// Where the system wants the program to end.
+    void endIfAsked(bool isHostIdle);
     void choose(int command);
     void chooseOfList(int command);
     void chooseView(int command, TracksView& view);
@@ -63,7 +66,9 @@ private:
     TracksView* tracks();
     std::vector<standin::MenuRegistry::Command> moduleCommands();
     MenuState menuState();
+    std::vector<MenuState::Recent> recentFiles();
 
+    EndSignals m_endSignals;
     EventLoop m_loop;
     standin::Videos m_videos;
     MainWindow m_window;
@@ -71,11 +76,13 @@ private:
     standin::Application m_application;
     std::optional<standin::ModuleLoader> m_module;
     RecentFiles m_recent;
+    std::vector<std::filesystem::path> m_listedRecent; ///< in the menu
+    MissingFiles m_missingRecent;
     OpenDocuments m_documents;
     Workspace m_workspace;
     FrameStills m_stills;
     std::map<const OpenDocument*, std::unique_ptr<ProjectTracks>> m_tracks;
-    std::vector<std::function<void()>> m_acts;
+    ActQueue m_acts;
     std::chrono::steady_clock::time_point m_nextLook{};
     bool m_isDone = false;
 };

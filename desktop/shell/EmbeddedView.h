@@ -7,10 +7,14 @@
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
+#include <chrono>
 #include <string>
 #include <vector>
 
 namespace desktop {
+
+/// The X window of a component; 0 for none.
+XContainer::Window windowOf(const juce::ComponentPeer* peer);
 
 /// The place of a module's window in the window of the host. The module's view lies in an X window of its own over this component,
 /// which has its size. There is one such window at a time.
@@ -50,7 +54,12 @@ private:
 
     juce::String m_hint;
     Window* m_window = nullptr; ///< not owned
+    /// Of the window, or null.
+    juce::Image takePicture();
+
     juce::Image m_picture;
+    juce::Image m_formerPicture; ///< of the last time that it was covered
+    std::chrono::steady_clock::time_point m_uncovered;
     bool m_isCovered = false;
     bool m_hadKeyboard = false;
 };

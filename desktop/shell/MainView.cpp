@@ -63,10 +63,8 @@ private:
 };
 
 MainView::MainView()
-    : Component("Main View"), m_menuBar(this), m_divider(std::make_unique<Divider>([this](int height) {
-          m_wantedTracks = height < 0 ? height : std::max(height, ShellLayout::LeastTracksHeight);
-          layOut();
-      })),
+    : Component("Main View"), m_menuBar(this),
+      m_divider(std::make_unique<Divider>([this](int height) { setTracksHeight(height); })),
       m_embedded("Open a project with Ctrl+O, or drop one here.")
 {
     m_menuBar.setLookAndFeel(&m_menuBarLook);
@@ -102,6 +100,12 @@ void MainView::setTracks(juce::Component* tracks)
     m_tracks = tracks;
     if (tracks)
         m_desk.addAndMakeVisible(tracks);
+    layOut();
+}
+
+void MainView::setTracksHeight(int height)
+{
+    m_wantedTracks = height < 0 ? height : std::max(height, ShellLayout::LeastTracksHeight);
     layOut();
 }
 

@@ -42,6 +42,9 @@ public:
     /// Not owned; null for none.
     void setTracks(juce::Component* tracks);
     EmbeddedView& embedded() { return m_embedded; }
+    /// The height to which the user has dragged the tracks; below 0 for none.
+    int tracksHeight() const { return m_wantedTracks; }
+    void setTracksHeight(int height);
     /// All but the boxes.
     juce::Component& desk() { return m_desk; }
 

@@ -16,8 +16,15 @@ MenuItem line()
 MenuItem fileMenu(const MenuState& state)
 {
     MenuItem recent{0, "Open Recent", "", !state.recentFiles.empty()};
-    for (std::size_t index = 0; index < state.recentFiles.size(); ++index)
-        recent.items.push_back({MenuCommand::FirstRecent + static_cast<int>(index), state.recentFiles[index]});
+    for (std::size_t index = 0; index < state.recentFiles.size(); ++index) {
+        const auto& [path, isMissing] = state.recentFiles[index];
+        recent.items.push_back(
+            {MenuCommand::FirstRecent + static_cast<int>(index), isMissing ? path + " (missing)" : path});
+    }
+    if (!recent.items.empty()) {
+        recent.items.push_back(line());
+        recent.items.push_back({MenuCommand::ClearRecent, "Clear This List"});
+    }
     return {0,
             "File",
             "",

@@ -24,6 +24,7 @@ struct MenuCommand {
         AddVideo,
         Keys,
         About,
+        ClearRecent,
     };
     static constexpr int FirstRecent = 1000;
     static constexpr int FirstOfModules = 2000;
@@ -44,7 +45,12 @@ struct MenuItem {
 /// What the menus show.
 struct MenuState {
     bool hasProject = false;
-    std::vector<std::string> recentFiles; ///< the latest first
+    /// A project that was open before.
+    struct Recent {
+        std::string path;
+        bool isMissing = false;
+    };
+    std::vector<Recent> recentFiles; ///< the latest first
     std::vector<std::u16string> undoNames;
     std::size_t undoPosition = 0;
     std::vector<std::u16string> moduleCommands; ///< those of the menu "Project"

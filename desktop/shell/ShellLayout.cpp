@@ -11,7 +11,7 @@ ShellLayout ShellLayout::of(int height, int wantedTracks)
     ShellLayout layout;
     layout.tracksTop = MenuHeight + TabHeight;
     const int room = std::max(0, height - layout.tracksTop - DividerHeight);
-    const int usual = std::max(UsualTracksHeight, room - WantedModuleHeight);
+    const int usual = std::max(std::min(UsualTracksHeight, room / UsualTracksPart), room - WantedModuleHeight);
     const int most = std::max(LeastTracksHeight, room - LeastModuleHeight);
     const int tracks = std::clamp(wantedTracks < 0 ? usual : wantedTracks, LeastTracksHeight, most);
     layout.tracksHeight = std::min(tracks, room);

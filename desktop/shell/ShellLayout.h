@@ -13,8 +13,9 @@ struct ShellLayout {
     static constexpr int WantedModuleHeight = 750;
     static constexpr int LeastModuleHeight = 200;
     static constexpr int LeastTracksHeight = 120;
-    /// What the tracks have at least where the user hasn't moved the divider.
+    /// What the tracks have at least where the user hasn't moved the divider, but on a small screen no more than the given part.
     static constexpr int UsualTracksHeight = 260;
+    static constexpr int UsualTracksPart = 4;
 
     int tracksTop = 0;
     int tracksHeight = 0;

@@ -16,6 +16,7 @@
 #include "util/Result.h"
 #include "velmark/Attributes.h"
 
+#include <exception>
 #include <variant>
 #include <vector>
 
@@ -120,6 +121,9 @@ bool StoredChange::look(const standin::Project& project)
         m_event = selectedEvent(model);
         return true;
     } catch (Result::Type) {
+        return false;
+    } catch (const std::exception&) {
+        // Such as a count in it for which there is no memory.
         return false;
     }
 }

@@ -8,7 +8,11 @@
 #include "standin/file/MediaMove.h"
 #include "standin/project/Project.h"
 
+#include <algorithm>
 #include <ctime>
+#include <system_error>
+#include <utility>
+#include <vector>
 
 namespace desktop {
 
@@ -60,6 +64,18 @@ void Workspace::chooseAndOpen()
         open(toUtf8(file));
 }
 
+bool Workspace::openRecent(RecentFiles& recent, const fs::path& path)
+{
+    enum { Remove, Cancel };
+    std::error_code ignored;
+    if (fs::exists(path, ignored))
+        return open(path);
+    if (ask(quotedName(path) + " isn't there.\n\n" + path.string(), {u"Take It off the List", u"Cancel"}, Cancel) ==
+        Remove)
+        recent.remove(path);
+    return false;
+}
+
 bool Workspace::open(const fs::path& path)
 {
     enum { Recover, OpenWithout, Cancel };
@@ -98,7 +114,11 @@ bool Workspace::told(const SaveAnswer& answer)
 
 bool Workspace::save(OpenDocument& document)
 {
-    const SaveAnswer answer = m_documents.save(document);
+    return settled(document, m_documents.save(document));
+}
+
+bool Workspace::settled(OpenDocument& document, const SaveAnswer& answer)
+{
     const bool isSaved = answer.state == SaveAnswer::State::Changed || answer.state == SaveAnswer::State::Missing
                              ? settle(document, answer)
                              : told(answer);
@@ -127,25 +147,31 @@ bool Workspace::saveAs(OpenDocument& document)
     const auto& filter = document.project().form() ? ArdourFilter : StageFilter;
     const auto files =
         m_boxes.chooseFiles({u"Save Project As", {filter}, toUtf16(document.path().parent_path().string()), true});
-    if (files.empty() || !told(m_documents.saveAs(document, toUtf8(files.front()))))
-        return false;
-    m_told.erase(&document);
-    return true;
+    return !files.empty() && settled(document, m_documents.saveAs(document, toUtf8(files.front())));
 }
 
 bool Workspace::close(OpenDocument& document)
 {
+    if (!mayClose(document))
+        return false;
+    drop(document);
+    return true;
+}
+
+bool Workspace::mayClose(OpenDocument& document)
+{
     enum { Save, Drop };
-    if (document.settleUnsaved()) {
-        const std::size_t answer = ask(quotedName(document.path()) + " has changes that aren't saved.",
-                                       {u"Save", u"Close without Saving", u"Cancel"});
-        const bool mayClose = answer == Drop || (answer == Save && save(document));
-        if (!mayClose)
-            return false;
-    }
+    if (!document.settleUnsaved())
+        return true;
+    const std::size_t answer = ask(quotedName(document.path()) + " has changes that aren't saved.",
+                                   {u"Save", u"Close without Saving", u"Cancel"});
+    return answer == Drop || (answer == Save && save(document));
+}
+
+void Workspace::drop(OpenDocument& document)
+{
     m_told.erase(&document);
     m_documents.close(document);
-    return true;
 }
 
 void Workspace::activateTab(std::uint64_t id)
@@ -162,11 +188,16 @@ void Workspace::closeTab(std::uint64_t id)
 
 bool Workspace::closeAll()
 {
-    while (m_documents.size() > 0) {
-        OpenDocument& next = m_documents.active() ? *m_documents.active() : m_documents.at(0);
-        if (!close(next))
-            return false;
-    }
+    std::vector<OpenDocument*> open;
+    for (std::size_t index = 0; index < m_documents.size(); ++index)
+        open.push_back(&m_documents.at(index));
+    // About the one in front first.
+    std::stable_partition(open.begin(), open.end(),
+                          [this](const OpenDocument* it) { return it == m_documents.active(); });
+    if (!std::ranges::all_of(open, [this](OpenDocument* document) { return mayClose(*document); }))
+        return false;
+    for (OpenDocument* const document : open)
+        drop(*document);
     return true;
 }
 
@@ -200,17 +231,23 @@ bool Workspace::addVideo(OpenDocument& document, const fs::path& video)
     return false;
 }
 
-bool Workspace::isReloadWanted(const std::string& name, bool isUnsaved)
+bool Workspace::isReloadWanted(const OpenDocument& document)
 {
     enum { Reload, Keep };
-    return ask(name + " was changed by another program." + (isUnsaved ? " Reloading loses what isn't saved here." : ""),
-               {u"Reload", u"Keep What Is Here"}, Keep) == Reload;
+    std::string question = quotedName(document.path()) + " was changed by another program.";
+    if (document.isUnsaved())
+        question += " If you reload it, what isn't saved here is kept in the file " +
+                    quotedName(Autosave::asidePathFor(document.path())) + ".";
+    return ask(question, {u"Reload", u"Keep What Is Here"}, Keep) == Reload;
 }
 
 void Workspace::lookAtAutosaves()
 {
     for (std::size_t index = 0; index < m_documents.size(); ++index) {
-        const OpenDocument& document = m_documents.at(index);
+        OpenDocument& document = m_documents.at(index);
+        if (const auto work = document.takeWorkOfOther())
+            return tell("Another program has ended without saving " + quotedName(document.path()) +
+                        ". Its work is kept in the file " + quotedName(*work) + ".");
         const std::string& fault = document.autosaveFault();
         if (fault.empty() || !document.isUnsaved() || !m_toldFaults.try_emplace(document.id(), fault).second)
             continue;
@@ -231,7 +268,7 @@ void Workspace::lookAtFile()
     const std::string name = quotedName(document->path());
     if (state == StoredFile::State::Missing)
         tell(name + " is no longer on the disk. What is open here can be saved there again.");
-    else if (state == StoredFile::State::Changed && isReloadWanted(name, document->isUnsaved()))
+    else if (state == StoredFile::State::Changed && isReloadWanted(*document))
         reload(*document);
 }
 

@@ -126,10 +126,22 @@ std::optional<std::size_t> ChangeMap::eventOf(const Span& stretch, State program
     return found;
 }
 
-std::optional<Span> ChangeMap::placeOf(std::size_t event) const
+const ChangeMap::Stretch* ChangeMap::find(std::size_t event) const
 {
     const auto found = std::ranges::find(m_stretches, event, &Stretch::event);
-    if (found == m_stretches.end())
+    return found == m_stretches.end() ? nullptr : &*found;
+}
+
+std::optional<ChangeMap::Move> ChangeMap::moveOf(std::size_t event) const
+{
+    const Stretch* const found = find(event);
+    return found ? std::optional(Move{found->former.start, found->present.start}) : std::nullopt;
+}
+
+std::optional<Span> ChangeMap::placeOf(std::size_t event) const
+{
+    const Stretch* const found = find(event);
+    if (!found)
         return std::nullopt;
     return m_state == State::Carried ? found->present : found->former;
 }

@@ -36,6 +36,14 @@ public:
     /// The event that moves most of a stretch of the old programme (Planned), or has moved it to there in the new one (Carried):
     /// its index in the change EDL.
     std::optional<std::size_t> eventOf(const Span& stretch, State programme) const;
+    /// From where to where an event takes the beginning of its stretch. Nothing for one that isn't valid.
+    struct Move {
+        double source;
+        double destination;
+
+        bool operator==(const Move&) const = default;
+    };
+    std::optional<Move> moveOf(std::size_t event) const;
     /// Where an event puts its stretch. Nothing for one that isn't valid.
     std::optional<Span> placeOf(std::size_t event) const;
     /// Where the pieces of a stretch stood that the change has moved, in the order of the new programme. Empty while nothing
@@ -56,6 +64,8 @@ private:
         Span present;
         bool isReversed;
     };
+
+    const Stretch* find(std::size_t event) const;
 
     State m_state = State::Planned;
     std::vector<Stretch> m_stretches;       ///< in the order of their present places

@@ -5,6 +5,8 @@
 #include "host/picture/ImageProviderThread.h"
 
 #include <algorithm>
+#include <iterator>
+#include <utility>
 
 namespace desktop {
 
@@ -22,8 +24,9 @@ constexpr int Widest = 4;
 
 } // namespace
 
-FrameStills::FrameStills(Velmark::IHostContext* context, std::size_t capacity)
-    : m_thread(std::make_unique<ImageProviderThread>(context)), m_capacity(capacity)
+FrameStills::FrameStills(Velmark::IHostContext* context, std::size_t capacity, std::chrono::milliseconds retryInterval)
+    : m_thread(std::make_unique<ImageProviderThread>(context)), m_capacity(capacity), m_retryInterval(retryInterval),
+      m_nextRetry(std::chrono::steady_clock::now() + retryInterval)
 {
 }
 
@@ -39,6 +42,7 @@ juce::Image FrameStills::still(MediaClip& clip, std::uint32_t frame, int height)
     const Key key{&clip, frame, height};
     if (const auto found = m_kept.find(key); found != m_kept.end()) {
         m_uses.splice(m_uses.begin(), m_uses, found->second.use);
+        found->second.asking = m_asking;
         return found->second.image;
     }
     if (key != m_atWork.key && m_thread->canDraw() && height > 0 && frame < clip.getFrameCount()) {
@@ -50,18 +54,73 @@ juce::Image FrameStills::still(MediaClip& clip, std::uint32_t frame, int height)
     return {};
 }
 
+void FrameStills::startAsking()
+{
+    m_wanted.clear();
+    ++m_asking;
+}
+
 bool FrameStills::poll()
 {
     juce::Image image;
     bool success = false;
-    const bool hasCome = m_thread->fetch(image, success);
-    if (hasCome) {
-        keep(m_atWork, success ? image : juce::Image());
-        m_atWork = {};
-    }
+    const bool hasMore = m_thread->fetch(image, success) && take(success ? image : juce::Image());
+    wantAgain();
     if (!m_atWork.clip)
         startNext();
-    return hasCome && success;
+    return hasMore;
+}
+
+bool FrameStills::isPictureless(const Key& key, const juce::Image& image)
+{
+    return image.isNull() || image.getWidth() >= key.height * Widest;
+}
+
+bool FrameStills::take(juce::Image image)
+{
+    const Wanted come = std::exchange(m_atWork, {});
+    const auto before = m_kept.find(come.key);
+    const bool isRetry = before != m_kept.end();
+    if (isRetry)
+        forget(before);
+    const bool hasMore = !image.isNull() && !(isRetry && isPictureless(come.key, image));
+    // The file has come back.
+    if (isRetry && hasMore)
+        forgetPictureless(come.key.clip);
+    keep(come, std::move(image));
+    return hasMore;
+}
+
+void FrameStills::forget(std::map<Key, Kept>::iterator kept)
+{
+    m_bytes -= bytesOf(kept->second.image);
+    m_uses.erase(kept->second.use);
+    m_kept.erase(kept);
+}
+
+void FrameStills::forgetPictureless(const MediaClip* clip)
+{
+    for (auto kept = m_kept.begin(); kept != m_kept.end();) {
+        const auto next = std::next(kept);
+        if (kept->first.clip == clip && isPictureless(kept->first, kept->second.image))
+            forget(kept);
+        kept = next;
+    }
+}
+
+void FrameStills::wantAgain()
+{
+    const auto now = std::chrono::steady_clock::now();
+    if (m_atWork.clip || !m_wanted.empty() || now < m_nextRetry)
+        return;
+    m_nextRetry = now + m_retryInterval;
+    const MediaClip* last = nullptr;
+    for (const auto& [key, kept] : m_kept) {
+        if (key.clip == last || kept.asking != m_asking || !isPictureless(key, kept.image))
+            continue;
+        last = key.clip;
+        m_wanted.push_back({key, kept.clip});
+    }
 }
 
 void FrameStills::startNext()
@@ -84,13 +143,9 @@ void FrameStills::keep(const Wanted& wanted, juce::Image image)
 {
     m_uses.push_front(wanted.key);
     m_bytes += bytesOf(image);
-    m_kept.insert_or_assign(wanted.key, Kept{wanted.clip, std::move(image), m_uses.begin()});
-    while (m_bytes > m_capacity && m_uses.size() > 1) {
-        const auto last = m_kept.find(m_uses.back());
-        m_bytes -= bytesOf(last->second.image);
-        m_kept.erase(last);
-        m_uses.pop_back();
-    }
+    m_kept.insert_or_assign(wanted.key, Kept{wanted.clip, std::move(image), m_uses.begin(), m_asking});
+    while (m_bytes > m_capacity && m_uses.size() > 1)
+        forget(m_kept.find(m_uses.back()));
 }
 
 } // namespace desktop

@@ -17,6 +17,9 @@ juce::String shownName(const std::u16string& name);
 /// times a second.
 class NameDrawing {
 public:
+    /// The font of all names, as in cadrel::gui::getFont.
+    static constexpr int FontIndex = 4;
+
     explicit NameDrawing(juce::Font font) : m_font(std::move(font)) {}
 
     /// As many letters as have room, in the current colour; none where fewer than three of a longer name have. `baseline` is

@@ -20,7 +20,6 @@ using standin::Track;
 
 namespace {
 
-constexpr int NameFont = 4;
 constexpr int FolderFont = 2;
 constexpr int Indent = 10;
 constexpr int DeepestIndent = 5;
@@ -133,10 +132,11 @@ void TrackHeaders::paintRow(juce::Graphics& graphics, std::size_t row)
         line.removeFromLeft(MarkerSymbol::Size + 5);
     }
     const bool isDim = isFolder || track.kind() == Track::Kind::Ruler;
-    cadrel::gui::drawText(
-        graphics, shownName(track.name()), static_cast<float>(line.getX()), static_cast<float>(line.getY()),
-        static_cast<float>(line.getWidth()), static_cast<float>(line.getHeight()), juce::Justification::centredLeft,
-        getFont(isFolder ? FolderFont : NameFont), toColour(isDim ? TracksPalette::dimText : Palette::text), true);
+    cadrel::gui::drawText(graphics, shownName(track.name()), static_cast<float>(line.getX()),
+                          static_cast<float>(line.getY()), static_cast<float>(line.getWidth()),
+                          static_cast<float>(line.getHeight()), juce::Justification::centredLeft,
+                          getFont(isFolder ? FolderFont : NameDrawing::FontIndex),
+                          toColour(isDim ? TracksPalette::dimText : Palette::text), true);
 }
 
 std::optional<TrackHeaders::Spot> TrackHeaders::spotAt(juce::Point<int> place) const

@@ -29,7 +29,6 @@ using standin::Track;
 
 namespace {
 
-constexpr int NameFont = 4;
 constexpr int NameHeight = 15;  ///< the band of a clip that its name stands in
 constexpr int LeastBody = 8;    ///< what a clip has below the band; a lower one is all band
 constexpr int NameBaseline = 4; ///< above the lower edge of a band of that height
@@ -109,7 +108,7 @@ void drawDashes(juce::Graphics& graphics, Columns columns, int y, Columns seen)
 
 } // namespace
 
-TrackLanes::TrackLanes(TracksView& view) : m_view(view), m_names(getFont(NameFont)), m_hatch(makeHatch())
+TrackLanes::TrackLanes(TracksView& view) : m_view(view), m_names(getFont(NameDrawing::FontIndex)), m_hatch(makeHatch())
 {
     setOpaque(true);
 }

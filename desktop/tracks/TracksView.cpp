@@ -77,7 +77,6 @@ TracksView::TracksView(standin::Project& project, standin::EditService& edits, S
         bar->addListener(this);
         addAndMakeVisible(bar);
     }
-    startTimerHz(PollsPerSecond);
 }
 
 TracksView::~TracksView()
@@ -294,6 +293,14 @@ TracksView::Times TracksView::times() const
     return {m_project.position().getValue(),
             {m_project.locatorLeft().getValue(), m_project.locatorRight().getValue(), m_project.cycleLeft().getValue(),
              m_project.cycleRight().getValue()}};
+}
+
+void TracksView::followWindow()
+{
+    if (!isVisible() || !getParentComponent())
+        stopTimer();
+    else if (!isTimerRunning())
+        startTimerHz(PollsPerSecond);
 }
 
 void TracksView::timerCallback()

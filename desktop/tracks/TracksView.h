@@ -72,8 +72,8 @@ public:
     /// Whether outlines show where each clip stood before.
     void setGhosts(bool shown);
     bool showsGhosts() const { return m_showsGhosts; }
-    /// Scrolls to the place of an event of the change EDL and marks the clips that it moves; nothing unmarks them.
-    void showEvent(std::optional<std::size_t> event);
+    /// Marks the clips that an event of the change EDL moves, and scrolls to its place if wanted; nothing unmarks them.
+    void showEvent(std::optional<std::size_t> event, bool scrolls = true);
 
     /// The user has clicked on a clip: the index of the event in the change EDL that moves it or has moved it.
     std::function<void(std::size_t event)> onClipClicked;
@@ -86,6 +86,8 @@ public:
 
     void paint(juce::Graphics& graphics) override;
     void resized() override;
+    void visibilityChanged() override { followWindow(); }
+    void parentHierarchyChanged() override { followWindow(); }
     bool keyPressed(const juce::KeyPress& key) override;
     void mouseWheelMove(const juce::MouseEvent& event, const juce::MouseWheelDetails& wheel) override;
 
@@ -130,6 +132,8 @@ private:
     int viewWidth() const;
     void scrollBarMoved(juce::ScrollBar* bar, double start) override;
     void timerCallback() override;
+    /// Nothing is polled for a view that isn't in the window, such as that of another tab.
+    void followWindow();
     Times times() const;
 
     juce::SharedResourcePointer<cadrel::gui::LookAndFeel> m_look;

@@ -26,11 +26,11 @@ void TracksView::setGhosts(bool shown)
     m_lanes->repaint();
 }
 
-void TracksView::showEvent(std::optional<std::size_t> event)
+void TracksView::showEvent(std::optional<std::size_t> event, bool scrolls)
 {
     update();
     m_shownEvent = event;
-    if (const auto place = event ? m_change.placeOf(*event) : std::nullopt) {
+    if (const auto place = event && scrolls ? m_change.placeOf(*event) : std::nullopt) {
         const double first = m_scale.pixelAt(place->start);
         // What is seen stays as it is if the event begins in it. Else it shows something before the event, too.
         if (first < 0.0 || first > 0.9 * viewWidth())

@@ -49,7 +49,8 @@ private:
     /// The track that was stored for a route, taken out of the project, or a new one.
     Velmark::Counted<Track> trackOf(SessionId route);
     void readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track);
-    void readRegion(const pugi::xml_node& region, Track& track);
+    /// Gives its id.
+    SessionId readRegion(const pugi::xml_node& region, Track& track);
     /// How far the frame lies from a time that is near to it, in seconds; 0 for a time that isn't, and where each frame is a
     /// whole number of samples.
     double distanceToFrame(double seconds) const;
@@ -59,6 +60,9 @@ private:
     void readLocations(Project& project);
     void readVideo(Project& project);
     void placeOwnMarkers(Project& project);
+    /// Whether a location that is said to stand for a marker on a track of Cadrel's has its place or the kind in its name. One
+    /// that has neither is the user's.
+    bool isOwn(const ArdourSession::Location& location, const Track& track, const Node& marker) const;
     void placeMarkersOfTheUser(Project& project);
 
     TextRange rangeOf(const pugi::xml_node& node) const;

@@ -19,23 +19,22 @@ namespace {
 
 constexpr double NanosecondsPerSecond = 1e9;
 
-/// Whether a name begins with words, whatever letters of the Latin alphabet are large in both.
-bool beginsWith(std::u16string_view name, std::u16string_view words)
+} // namespace
+
+bool hasKind(std::u16string_view location, std::u16string_view track)
 {
     const auto small = [](char16_t letter) {
         return letter >= u'A' && letter <= u'Z' ? static_cast<char16_t>(letter - u'A' + u'a') : letter;
     };
-    return std::ranges::equal(name.substr(0, words.size()), words, {}, small, small);
+    return std::ranges::equal(location.substr(0, track.size()), track, {}, small, small);
 }
-
-} // namespace
 
 std::u16string ownLocationName(const std::u16string& track, const std::u16string& marker)
 {
     const std::u16string name = marker.substr(0, marker.find_last_not_of(u' ') + 1);
     if (name.empty())
         return track;
-    return beginsWith(name, track) ? name : track + u": " + name;
+    return hasKind(name, track) ? name : track + u": " + name;
 }
 
 double contentEnd(const Project& project)

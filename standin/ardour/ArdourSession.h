@@ -12,6 +12,7 @@
 #include <map>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -26,6 +27,9 @@ using SessionId = std::int64_t;
 /// The name of the location that stands for a marker on a track of Cadrel's: with the kind of the marker, which is the name of
 /// its track, but once.
 std::u16string ownLocationName(const std::u16string& track, const std::u16string& marker);
+
+/// Whether a location's name begins with the kind, whatever letters are large.
+bool hasKind(std::u16string_view location, std::u16string_view track);
 
 /// The id that an attribute of a node holds; 0 without one.
 SessionId attributeId(const Node& node, const char* key);
@@ -52,6 +56,7 @@ struct ArdourSession {
         SessionId source = 0;
         std::optional<CutMark> head{}; ///< of an edge at which an earlier run has cut
         std::optional<CutMark> tail{};
+        bool isMusical = false; ///< one of its times was told in beats
     };
     struct List {
         TextRange text;

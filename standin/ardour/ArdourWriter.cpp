@@ -113,6 +113,10 @@ void ArdourWriter::writeRegion(const ArdourSession::Region& region, const std::v
         m_patch.remove(region.text);
         return;
     }
+    if (pieces.size() == 1 && pieces.front().isWhole(region) && !region.isMusical) {
+        moveRegion(region, pieces.front().position);
+        return;
+    }
     const auto next = [this] { return newId(); };
     const unsigned depth = depthOf(region.text, m_session.text);
     std::string text;
@@ -128,6 +132,23 @@ void ArdourWriter::writeRegion(const ArdourSession::Region& region, const std::v
         text += printed(element.node, depth);
     }
     m_patch.replace(region.text, std::move(text));
+}
+
+void ArdourWriter::moveRegion(const ArdourSession::Region& region, std::int64_t position)
+{
+    const SessionClock& clock = m_session.clock;
+    const std::string place = clock.timeText(position);
+    const std::string length = clock.timeText(region.length);
+    visitAttributes(startTagOf(region.text, m_session.text), m_session.text,
+                    [&](std::string_view name, const TextRange& value) {
+                        if (name == "length" && clock.hasUnits())
+                            m_patch.replace(value, length + "@" + place);
+                        else if (name == "position" && !clock.hasUnits())
+                            m_patch.replace(value, place);
+                        // It stands at a sample now, not at a beat.
+                        else if (name == "positional-lock-style" && !clock.hasUnits())
+                            m_patch.replace(value, "AudioTime");
+                    });
 }
 
 void ArdourWriter::writeLists()

@@ -25,6 +25,8 @@ public:
 private:
     void writePlaylist(const ArdourSession::Playlist& playlist, const Track& track);
     void writeRegion(const ArdourSession::Region& region, const std::vector<RegionPiece>& pieces);
+    /// Writes its place alone.
+    void moveRegion(const ArdourSession::Region& region, std::int64_t position);
     void writeLists();
     void writeList(const ArdourSession::List& list, const Envelope& curve);
     void writeLocations();

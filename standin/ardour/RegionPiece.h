@@ -32,11 +32,13 @@ struct RegionPiece {
     /// Whether an edge is one of the region, and is as it was.
     bool keepsHead() const { return head == RegionEdge::Old || isHeadAsBefore; }
     bool keepsTail() const { return tail == RegionEdge::Old || isTailAsBefore; }
-    bool isAll(const ArdourSession::Region& region) const
+    /// Whether it is the whole region, wherever it stands now.
+    bool isWhole(const ArdourSession::Region& region) const
     {
-        return position == region.position && length == region.length && start == region.start && keepsHead() &&
-               keepsTail();
+        return length == region.length && start == region.start && keepsHead() && keepsTail();
     }
+    /// Whether nothing has become of the region.
+    bool isAll(const ArdourSession::Region& region) const { return position == region.position && isWhole(region); }
 };
 
 /// What is left of a region.

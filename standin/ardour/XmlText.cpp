@@ -82,23 +82,31 @@ TextRange startTagOf(const TextRange& element, std::string_view text)
     return {element.begin, endOfTag(text, element.begin)};
 }
 
-std::optional<TextRange> valueIn(const TextRange& startTag, std::string_view name, std::string_view text)
+void visitAttributes(const TextRange& startTag, std::string_view text,
+                     const std::function<void(std::string_view, const TextRange&)>& visit)
 {
-    constexpr std::string_view AroundNames = " \t\r\n=";
-    std::size_t at = startTag.begin;
-    while (true) {
-        const std::size_t open = text.find_first_of("\"'", at);
+    std::size_t at = text.find_first_of(Blanks, startTag.begin);
+    while (at < startTag.end) {
+        const std::size_t first = text.find_first_not_of(Blanks, at);
+        const std::size_t equals = text.find('=', first);
+        const std::size_t open = text.find_first_of("\"'", equals);
         if (open >= startTag.end)
-            return std::nullopt;
+            return;
         const std::size_t close = text.find(text[open], open + 1);
-        if (close >= startTag.end)
-            return std::nullopt;
-        const std::size_t last = text.find_last_not_of(AroundNames, open - 1);
-        const std::size_t first = text.find_last_of(AroundNames, last) + 1;
-        if (text.substr(first, last + 1 - first) == name)
-            return TextRange{open + 1, close};
+        const std::size_t last = text.find_last_not_of(Blanks, equals - 1);
+        visit(text.substr(first, last + 1 - first), {open + 1, close});
         at = close + 1;
     }
+}
+
+std::optional<TextRange> valueIn(const TextRange& startTag, std::string_view name, std::string_view text)
+{
+    std::optional<TextRange> value;
+    visitAttributes(startTag, text, [&](std::string_view found, const TextRange& range) {
+        if (found == name)
+            value = range;
+    });
+    return value;
 }
 
 unsigned depthOf(const TextRange& element, std::string_view text)

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstddef>
+#include <functional>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -26,6 +27,9 @@ struct TextRange {
 TextRange rangeOf(const pugi::xml_node& node, std::string_view text);
 /// The start tag alone.
 TextRange startTagOf(const TextRange& element, std::string_view text);
+/// Calls `visit` with each attribute's name and where its value stands, without its quotes.
+void visitAttributes(const TextRange& startTag, std::string_view text,
+                     const std::function<void(std::string_view, const TextRange&)>& visit);
 /// The value of an attribute in a start tag, without its quotes; nothing for one that isn't there.
 std::optional<TextRange> valueIn(const TextRange& startTag, std::string_view name, std::string_view text);
 /// How deep an element stands, by the blanks before it in its line.
@@ -47,7 +51,12 @@ public:
     explicit TextPatch(std::string_view text) : m_text(text) {}
 
     /// The ranges of all calls must not overlap.
-    void replace(const TextRange& range, std::string text) { m_edits.push_back({range, std::move(text)}); }
+    void replace(const TextRange& range, std::string text)
+    {
+        // There may be hundreds of thousands.
+        text.shrink_to_fit();
+        m_edits.push_back({range, std::move(text)});
+    }
     /// Also takes the blanks before it.
     void remove(TextRange range);
     /// What is inserted at one place stands there in the order of the calls.

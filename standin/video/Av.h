@@ -20,7 +20,15 @@ struct AvDeleter {
     void operator()(AVFrame* frame) const { av_frame_free(&frame); }
     void operator()(AVPacket* packet) const { av_packet_free(&packet); }
     void operator()(AVCodecContext* context) const { avcodec_free_context(&context); }
-    void operator()(AVFormatContext* context) const { avformat_close_input(&context); }
+    /// Closes what it reads from, too, even if that was opened by itself.
+    void operator()(AVFormatContext* context) const
+    {
+        const bool hasOwnBytes = (context->flags & AVFMT_FLAG_CUSTOM_IO) != 0;
+        AVIOContext* bytes = hasOwnBytes ? context->pb : nullptr;
+        avformat_close_input(&context);
+        avio_closep(&bytes);
+    }
+    void operator()(AVIOContext* bytes) const { avio_closep(&bytes); }
     void operator()(AVDictionary* dictionary) const { av_dict_free(&dictionary); }
     void operator()(SwsContext* context) const { sws_freeContext(context); }
 };

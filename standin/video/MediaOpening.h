@@ -13,8 +13,8 @@ namespace standin {
 /// deadline, which outlives it and may be changed meanwhile. Throws VideoError.
 AvOwner<AVFormatContext> openMedia(const std::filesystem::path& file, const Deadline& deadline);
 
-/// Throws what a failure of the libraries means: TooSlow after the deadline, else Broken. A lack of memory is no reason of its
-/// own, since broken files ask for any amount.
-[[noreturn]] void throwFailure(Deadline deadline);
+/// Throws what a failure of the libraries means: TooSlow after the deadline, else the reason. A lack of memory is no reason of
+/// its own, since broken files ask for any amount.
+[[noreturn]] void throwFailure(Deadline deadline, VideoError::Reason reason);
 
 } // namespace standin

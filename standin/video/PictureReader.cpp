@@ -69,7 +69,7 @@ void findStreams(AVFormatContext& format, Deadline deadline)
     for (AVDictionary* dictionary : perStream)
         av_dict_free(&dictionary);
     if (found < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, Reason::Unreadable);
 }
 
 /// The video; nothing else is read from then on.
@@ -87,17 +87,19 @@ AvOwner<AVCodecContext> openDecoder(const AVStream& stream, Deadline deadline)
 {
     const AVCodecParameters& parameters = *stream.codecpar;
     const AVCodec* const codec = avcodec_find_decoder(parameters.codec_id);
-    if (!codec || !isPositive(stream.time_base))
+    if (!codec)
+        throw VideoError(Reason::UnknownKind);
+    if (!isPositive(stream.time_base))
         throw VideoError(Reason::Broken);
     auto decoder = owned(avcodec_alloc_context3(codec));
     if (avcodec_parameters_to_context(decoder.get(), &parameters) < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, Reason::Broken);
     decoder->pkt_timebase = stream.time_base;
     AVDictionary* options = decoderOptions().release();
     const int error = avcodec_open2(decoder.get(), codec, &options);
     av_dict_free(&options);
     if (error < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, Reason::Broken);
     return decoder;
 }
 
@@ -170,15 +172,27 @@ bool PictureReader::readPacket()
         m_packet->pts = sensible(m_packet->pts, NoTime);
         m_packet->dts = sensible(m_packet->dts, NoTime);
         m_packet->duration = sensible(m_packet->duration, 0);
+        m_tellsPlaces = m_tellsPlaces || m_packet->pos >= 0;
         if (!m_waitsForKey)
             return true;
-        if ((m_packet->flags & AV_PKT_FLAG_KEY) == 0)
+        if (!isEntry(*m_packet))
             continue;
         m_waitsForKey = false;
         if (m_packet->pts != NoTime)
             m_entry = m_packet->pts;
         return true;
     }
+}
+
+/// Whether decoding can begin there after a seek. Some files tell only the time of every few pictures, which are those that have
+/// a place in the file. The first packet after a seek may be the rest of a picture and take that time instead, so that all up to
+/// the next such picture are counted from the wrong one.
+bool PictureReader::isEntry(const AVPacket& packet)
+{
+    const bool isKey = (packet.flags & AV_PKT_FLAG_KEY) != 0;
+    const bool isFirst = std::exchange(m_isAfterSeek, false);
+    m_hasTrueTimes = m_hasTrueTimes || !m_tellsPlaces || (packet.pos >= 0 && (isKey || !isFirst));
+    return isKey && m_hasTrueTimes;
 }
 
 /// Says whether the decoder leaves the packet out if no other depends on it.
@@ -201,6 +215,8 @@ bool PictureReader::seek(std::int64_t ticks)
     avcodec_flush_buffers(m_decoder.get());
     restart();
     m_waitsForKey = true;
+    m_isAfterSeek = true;
+    m_hasTrueTimes = false;
     return true;
 }
 
@@ -223,6 +239,8 @@ void PictureReader::rewind()
     m_stream = &stream;
     restart();
     m_waitsForKey = false;
+    // A film without times begins where the file says, or at 0.
+    m_lastTime = sensible(m_stream->start_time, 0) - m_frameTicks;
 }
 
 void PictureReader::restart()
@@ -244,13 +262,14 @@ std::int64_t PictureReader::findEnd()
         if (!seek(start + length - back))
             break;
         const Tail tail = readTail();
-        if (tail.hasUnknownTimes && seek(start + length - back))
-            return decodeTail();
-        if (tail.end)
-            return *tail.end;
+        const bool isDecoded = tail.hasUnknownTimes && seek(start + length - back);
+        if (const auto end = isDecoded ? decodeTail() : tail.end)
+            return *end;
     }
     rewind();
-    return decodeTail();
+    if (const auto end = decodeTail())
+        return *end;
+    throw VideoError(Reason::Broken);
 }
 
 /// The length in ticks that the file claims to have; 0 when it tells none.
@@ -282,15 +301,14 @@ PictureReader::Tail PictureReader::readTail()
     return tail;
 }
 
-std::int64_t PictureReader::decodeTail()
+/// Nothing when no picture from here on has a time.
+std::optional<std::int64_t> PictureReader::decodeTail()
 {
     const auto picture = owned(av_frame_alloc());
     std::optional<std::int64_t> end;
     while (next(*picture))
         end = timeOf(*picture) + durationOf(*picture);
-    if (!end)
-        throw VideoError(Reason::Broken);
-    return *end;
+    return end;
 }
 
 std::int64_t PictureReader::durationOf(const AVFrame& picture) const

@@ -62,6 +62,7 @@ private:
     /// Gives the decoder what comes next, which may be the end.
     void feed();
     bool readPacket();
+    bool isEntry(const AVPacket& packet);
     void decide(const AVPacket& packet);
     void restart();
 
@@ -72,7 +73,7 @@ private:
     };
     std::int64_t toldLength() const;
     Tail readTail();
-    std::int64_t decodeTail();
+    std::optional<std::int64_t> decodeTail();
 
     std::filesystem::path m_file;
     Deadline m_deadline;
@@ -85,6 +86,9 @@ private:
     bool m_hasLostItsPlace = false;
     bool m_isDrained = false;            ///< the end of the file has been told to the decoder
     bool m_waitsForKey = false;          ///< after a seek
+    bool m_isAfterSeek = false;          ///< nothing has been read since
+    bool m_hasTrueTimes = false;         ///< of what has been read since
+    bool m_tellsPlaces = false;          ///< the file says where some of its packets are
     std::optional<std::int64_t> m_entry; ///< of the key picture at which it began after a seek
     std::optional<std::int64_t> m_leaveOutBefore;
     std::optional<std::int64_t> m_lastLeftOut;

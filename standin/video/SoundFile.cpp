@@ -10,7 +10,7 @@ SoundFile SoundFile::read(const std::filesystem::path& file, Deadline deadline)
 {
     const auto format = openMedia(file, deadline);
     if (avformat_find_stream_info(format.get(), nullptr) < 0)
-        throwFailure(deadline);
+        throwFailure(deadline, VideoError::Reason::Unreadable);
     const int index = av_find_best_stream(format.get(), AVMEDIA_TYPE_AUDIO, -1, -1, nullptr, 0);
     if (index < 0)
         throw VideoError(VideoError::Reason::NoSound);

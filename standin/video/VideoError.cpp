@@ -9,10 +9,16 @@ const char* VideoError::what() const noexcept
     switch (m_reason) {
     case Reason::Missing:
         return "The file is missing.";
+    case Reason::NotOpened:
+        return "The file can't be opened.";
+    case Reason::Unreadable:
+        return "The file has no picture or sound that can be read.";
     case Reason::NoPicture:
         return "The file has no picture.";
     case Reason::NoSound:
         return "The file has no sound.";
+    case Reason::UnknownKind:
+        return "The file's pictures are of a kind that can't be read.";
     case Reason::Broken:
         return "The file is broken here.";
     case Reason::TooLarge:

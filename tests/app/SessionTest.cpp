@@ -6,9 +6,7 @@
 #include "tests/standin/ardour/SessionText.h"
 
 #include <filesystem>
-#include <fstream>
 #include <gtest/gtest.h>
-#include <iterator>
 #include <nlohmann/json.hpp>
 #include <pugixml.hpp>
 
@@ -26,12 +24,6 @@ const std::string OldEdl = "TITLE: OLD\nFCM: NON-DROP FRAME\n"
 const std::string NewEdl = "TITLE: NEW\nFCM: NON-DROP FRAME\n"
                            "001  CAM002   V     C        11:00:00:00 11:00:02:00 00:00:00:00 00:00:02:00\n"
                            "002  CAM001   V     C        10:00:00:00 10:00:02:00 00:00:02:00 00:00:04:00\n";
-
-std::string contentOf(const std::filesystem::path& file)
-{
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
 
 class Session : public testing::Test {
 protected:

@@ -80,7 +80,8 @@ TEST(ShowMedia, TellsRateAndLengthOfWhatIsThereAndWhatIsMissing)
         << lost;
     const std::string tone = lineOf(outcome.out, "tone");
     EXPECT_TRUE(has(tone, "44100 Hz") && has(tone, "00:00:02:00")) << tone;
-    EXPECT_TRUE(has(lineOf(outcome.out, "text"), "text.mov: The file is broken here.")) << outcome.out;
+    EXPECT_TRUE(has(lineOf(outcome.out, "text"), "text.mov: The file has no picture or sound that can be read."))
+        << outcome.out;
 }
 
 TEST(ShowMedia, RefusesWhatGoesWithTracks)

@@ -51,8 +51,13 @@ Output run(const std::string& command)
 
 Output lua(const std::string& script, const fs::path& folder, const std::string& name, const std::string& more)
 {
-    const Output output = run("env FOLDER='" + folder.string() + "' NAME='" + name + "' " + more + " ardour7-lua '" +
-                              CADREL_TEST_SCRIPTS "/" + script + "'");
+    const std::string command = "env FOLDER='" + folder.string() + "' NAME='" + name + "' " + more + " ardour7-lua '" +
+                                CADREL_TEST_SCRIPTS "/" + script + "'";
+    // It crashes now and then when a script begins while sound files are still being read. The session is saved last.
+    constexpr int Signalled = 128;
+    Output output = run(command);
+    for (int attempt = 1; attempt < 3 && output.status > Signalled; ++attempt)
+        output = run(command);
     if (output.status != 0 || output.all().find("Error: ") != std::string::npos)
         throw std::runtime_error(script + ": " + output.all());
     return output;

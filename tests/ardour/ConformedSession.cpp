@@ -221,6 +221,10 @@ void ConformedSession::addRegions(const SessionPlan& plan) const
             for (const char* const flag : {"muted", "locked", "whole-file", "hidden", "envelope-active", "sync-marked",
                                            "automatic", "import", "external", "position-locked", "valid-transients"})
                 set(flag, "0");
+            if (plan.isVaried && index % 5 == 4)
+                region.attribute("muted") = "1";
+            if (plan.isVaried && index % 3 == 1)
+                region.attribute("scale-amplitude") = index % 2 == 0 ? "0.5" : "-1.25";
         }
     }
     pugi::xml_node locations = session.child("Locations");

@@ -59,7 +59,8 @@ struct SessionPlan {
         std::int64_t length;
     };
     std::vector<Place> places{};
-    int loudest = 4000; ///< of the noise, of 32,768
+    int loudest = 4000;    ///< of the noise, of 32,768
+    bool isVaried = false; ///< some regions are muted, and some have a gain or are turned upside down
     bool withBus = false;
     std::string drawn{};  ///< as ArdourProgram::draw takes it
     std::string points{}; ///< as ArdourProgram::automate takes it

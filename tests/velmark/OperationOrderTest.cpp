@@ -2,6 +2,7 @@
 
 #include "velmark/Attributes.h"
 #include "velmark/Automation.h"
+#include "velmark/ChangeView.h"
 #include "velmark/Context.h"
 #include "velmark/Editing.h"
 #include "velmark/Events.h"
@@ -174,6 +175,7 @@ TEST(OperationOrder, OfWhatTheModuleImplements)
                       &IPlugView::isPlatformTypeSupported),
               inARow(13));
     EXPECT_EQ(slotsOf(&IPlugFrame::resizeView), inARow(1));
+    EXPECT_EQ(slotsOf(&IChangeView::selectChange), inARow(1));
 }
 
 TEST(OperationOrder, OfTheFactory)

@@ -4,12 +4,11 @@
 
 #include "core/change/CandidateSearch.h"
 #include "core/change/TransitionPieces.h"
-#include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/MatchedName.h"
+#include "core/edl/ProgrammeOrder.h"
 
-#include <algorithm>
 #include <memory>
 #include <utility>
 
@@ -37,12 +36,6 @@ public:
     std::shared_ptr<EventBase> originAt(std::size_t index) const
     {
         return m_given.eventAt(index < m_given.size() ? index : m_origins[index - m_given.size()]);
-    }
-
-    std::shared_ptr<EventBase> originOf(const std::shared_ptr<EventBase>& event) const
-    {
-        const auto& events = m_events.events();
-        return originAt(static_cast<std::size_t>(std::find(events.begin(), events.end(), event) - events.begin()));
     }
 
 private:
@@ -91,17 +84,16 @@ Result::Type ChangeEdlGenerator::generate(const EventList& oldEvents, const Even
     }
     search.finish();
 
-    const CutMap newProgramme(newWork.events(), framerate);
     double lastDisplacement = 0.0;
     std::uint32_t number = 1;
-    for (const CutEntry& entry : newProgramme.dstInOrder()) {
-        const std::shared_ptr<EventBase> newEvent = entry.event.lock();
+    for (const PlacedEvent& placed : inProgrammeOrder(newWork.events().events(), framerate)) {
+        const std::shared_ptr<EventBase> newEvent = newWork.events().eventAt(placed.index);
         if (!newEvent->isValid())
             continue;
         const auto [key, isVfx] = comparisonName(*newEvent);
         newEvent->setVfx(isVfx);
         const auto fail = [&](std::size_t oldIndex) {
-            return onFailure({oldWork.originAt(oldIndex), newWork.originOf(newEvent)});
+            return onFailure({oldWork.originAt(oldIndex), newWork.originAt(placed.index)});
         };
         for (const ChangeCandidate& survivor : search.survivingCandidates(key, *newEvent, lastDisplacement, fail)) {
             survivor.changeEvent->setEventNumber(number++);

@@ -2,8 +2,8 @@
 
 #include "core/change/HealProcessing.h"
 
-#include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
+#include "core/edl/EventEdges.h"
 #include "core/edl/EventList.h"
 #include "core/edl/HealedEvent.h"
 #include "core/edl/ProgrammeOrder.h"
@@ -24,7 +24,7 @@ public:
     explicit Joining(const HealContext& context) : m_mode(context.settings->healMode()), m_framerate(context.framerate)
     {
         if (m_mode == HealMode::GapsWithoutInserts)
-            m_references.emplace(*context.referenceList, m_framerate);
+            m_references.emplace(context.referenceList->events(), &EventBase::dstIn, &EventBase::dstOut, m_framerate);
     }
 
     bool canJoin(const PlacedEvent& earlier, const PlacedEvent& later) const
@@ -51,21 +51,20 @@ private:
 
     bool hasInsertBetween(const PlacedEvent& earlier, const PlacedEvent& later) const
     {
-        const auto inGap =
-            m_references->eventsInDestinationRange(earlier.dstOut / m_framerate.rate, later.dstIn / m_framerate.rate);
-        for (const auto& entry : inGap) {
-            const std::shared_ptr<EventBase> reference = entry.lock();
-            const bool onlyTouches = reference->dstOut().toFrameCount(m_framerate) == earlier.dstOut ||
-                                     reference->dstIn().toFrameCount(m_framerate) == later.dstIn;
-            if (!onlyTouches)
-                return true;
-        }
-        return false;
+        bool hasInsert = false;
+        m_references->forEachInRange(earlier.dstOut / m_framerate.rate, later.dstIn / m_framerate.rate,
+                                     [&](const std::shared_ptr<EventBase>& reference) {
+                                         const bool onlyTouches =
+                                             reference->dstOut().toFrameCount(m_framerate) == earlier.dstOut ||
+                                             reference->dstIn().toFrameCount(m_framerate) == later.dstIn;
+                                         hasInsert = hasInsert || !onlyTouches;
+                                     });
+        return hasInsert;
     }
 
     std::int32_t m_mode;
     Framerate m_framerate;
-    std::optional<CutMap> m_references; ///< only for the mode that asks for inserts
+    std::optional<EventEdges> m_references; ///< only for the mode that asks for inserts
 };
 
 bool hasNothingToHeal(std::size_t count, const HealContext& context)

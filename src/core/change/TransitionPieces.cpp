@@ -2,12 +2,13 @@
 
 #include "core/change/TransitionPieces.h"
 
-#include "core/edl/CutMap.h"
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/MatchedName.h"
+#include "core/edl/ProgrammeOrder.h"
 #include "util/Result.h"
 
+#include <algorithm>
 #include <memory>
 #include <string>
 
@@ -99,15 +100,17 @@ std::vector<std::size_t> expandTransitions(EventList& events,
 
 void mergeTransitionPieces(EventList& changeEvents, std::int32_t matchBy)
 {
-    const CutMap map(changeEvents, Timecode::framerate());
-    const auto& order = map.dstInOrder();
+    const auto& events = changeEvents.events();
+    if (std::none_of(events.begin(), events.end(), [](const auto& event) { return event->isTransition(); }))
+        return;
+    const std::vector<PlacedEvent> order = inProgrammeOrder(events, Timecode::framerate());
     EventList absorbed;
     for (std::size_t index = 0; index < order.size(); ++index) {
-        const std::shared_ptr<EventBase> piece = order[index].event.lock();
+        const std::shared_ptr<EventBase> piece = changeEvents.eventAt(order[index].index);
         if (!piece->isTransition())
             continue;
         if (index + 1 < order.size()) {
-            const std::shared_ptr<EventBase> body = order[index + 1].event.lock();
+            const std::shared_ptr<EventBase> body = changeEvents.eventAt(order[index + 1].index);
             const bool bodyFollows = body->dstIn() == piece->dstOut() && body->srcIn() == piece->srcOut();
             if (bodyFollows && nameBy(matchBy, *piece).starts_with(PieceNamePrefix + nameBy(matchBy, *body))) {
                 piece->setOut(body->srcOut(), body->dstOut());

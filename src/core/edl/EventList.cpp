@@ -11,6 +11,7 @@
 #include <array>
 #include <iterator>
 #include <map>
+#include <typeinfo>
 #include <unordered_set>
 #include <utility>
 
@@ -326,7 +327,8 @@ void EventList::write(ByteArchive& archive) const
     archive.writeCount(size());
     for (const auto& event : m_events) {
         // A plain copy of a healed event has its kind, but not its body.
-        const bool isHealed = dynamic_cast<const HealedEvent*>(event.get()) != nullptr;
+        const EventBase& object = *event;
+        const bool isHealed = typeid(object) == typeid(HealedEvent);
         archive << static_cast<std::uint32_t>(isHealed ? EventKind::Healed : EventKind::Plain);
         archive << *event;
     }

@@ -76,6 +76,8 @@ std::vector<std::int32_t> FlawSet::values() const
 {
     const auto firstPositive = std::lower_bound(m_others.begin(), m_others.end(), 0);
     std::vector<std::int32_t> all(m_others.begin(), firstPositive);
+    if (isEmpty())
+        return all;
     for (std::int32_t flaw = 0; flaw < CommonCount; ++flaw) {
         if (contains(flaw))
             all.push_back(flaw);

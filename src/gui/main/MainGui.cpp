@@ -9,6 +9,7 @@
 #include "core/model/DataModel.h"
 #include "core/notify/ChangeContext.h"
 #include "core/notify/ChangeContextNotificationBase.h"
+#include "core/time/Timecode.h"
 #include "gui/guard/Guard.h"
 #include "gui/main/CutCommands.h"
 #include "gui/picture/VideoProviderBase.h"
@@ -195,6 +196,21 @@ void MainGui::componentEnablementChanged(juce::Component&)
         if (hasKeyboardFocus(false))
             focusChangeTable();
     });
+}
+
+bool MainGui::selectChange(const core::Timecode& srcIn, const core::Timecode& dstIn)
+{
+    bool isSelected = false;
+    guardUser([&] {
+        EventTableModel* const table = m_controls.panel(ListKind::Change).model();
+        if (!m_model || !table || !isEnabled() || !m_controls.isEnabled())
+            return;
+        const auto& events = m_model->changeEdl().events();
+        const auto found = std::ranges::find_if(
+            events, [&](const auto& event) { return event->srcIn() == srcIn && event->dstIn() == dstIn; });
+        isSelected = found != events.end() && table->selectEvent(*found);
+    });
+    return isSelected;
 }
 
 void MainGui::componentVisibilityChanged(juce::Component& component)

@@ -27,6 +27,7 @@ class ActionChangeContext;
 class CadrelerBase;
 class ChangeContextNotificationBase;
 class DataModel;
+class Timecode;
 } // namespace cadrel::core
 
 namespace cadrel::gui {
@@ -62,6 +63,10 @@ public:
 
     /// Null when no project is active.
     core::DataModel* model() const { return m_model; }
+
+    /// Selects the event of the change EDL with these SRC IN and DST IN, and no other, as the user does. False where there is
+    /// none, and where he couldn't do so now.
+    bool selectChange(const core::Timecode& srcIn, const core::Timecode& dstIn);
 
     void onChange(const core::ChangeContext& context) override;
     void paint(juce::Graphics& graphics) override;

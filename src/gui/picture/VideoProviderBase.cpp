@@ -42,8 +42,7 @@ void VideoProviderBase::setImageSize(int width, int height)
     m_size = size;
     for (juce::Image& image : m_images)
         image = juce::Image(juce::Image::ARGB, width, height, true);
-    request(OldSide);
-    request(NewSide);
+    requestBoth();
 }
 
 void VideoProviderBase::deliverImage(const juce::Image& image, std::size_t side)
@@ -63,6 +62,18 @@ bool VideoProviderBase::hasListeners() const
     bool hasAny = false;
     m_listeners.forEach([&](Listener&) { hasAny = true; });
     return hasAny;
+}
+
+/// The new side also when the old one is refused.
+void VideoProviderBase::requestBoth()
+{
+    try {
+        request(OldSide);
+    } catch (...) {
+        request(NewSide);
+        throw;
+    }
+    request(NewSide);
 }
 
 void VideoProviderBase::request(std::size_t side)

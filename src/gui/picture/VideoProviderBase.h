@@ -63,6 +63,7 @@ protected:
     virtual void requestImage(std::size_t side, int width, int height, bool lastFrame, double time) = 0;
 
 private:
+    void requestBoth();
     void request(std::size_t side);
 
     std::array<double, 2> m_times = {};

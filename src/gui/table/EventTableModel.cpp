@@ -49,6 +49,21 @@ RowSet toRowSet(const juce::SparseSet<int>& set)
     return rows;
 }
 
+/// Whether both are the same events, in whatever order.
+bool areSame(const std::vector<std::weak_ptr<EventBase>>& offered, const EventTableModel::Events& selected)
+{
+    const auto isSame = [](const std::weak_ptr<EventBase>& a, const std::shared_ptr<EventBase>& b) {
+        return a.lock() == b;
+    };
+    // They are in one order unless the table was sorted meanwhile.
+    if (std::equal(offered.begin(), offered.end(), selected.begin(), selected.end(), isSame))
+        return true;
+    std::unordered_set<std::shared_ptr<EventBase>> events;
+    for (const auto& event : offered)
+        events.insert(event.lock());
+    return events == std::unordered_set<std::shared_ptr<EventBase>>(selected.begin(), selected.end());
+}
+
 void addItems(juce::PopupMenu& menu, const std::vector<EventMenu::Item>& items)
 {
     for (const EventMenu::Item& item : items) {
@@ -153,6 +168,17 @@ void EventTableModel::selectRows(const RowSet& rows)
 {
     m_rows.select(rows);
     restore({});
+}
+
+bool EventTableModel::selectEvent(const std::shared_ptr<core::EventBase>& event)
+{
+    reloadIfStale();
+    const int row = m_rows.rowOf(event);
+    if (row < 0 || m_table == nullptr)
+        return false;
+    m_table->scrollToEnsureRowIsOnscreen(row);
+    m_table->selectRow(row);
+    return true;
 }
 
 void EventTableModel::setHighlight(const Events& events)
@@ -398,13 +424,9 @@ void EventTableModel::openMenuAt(juce::Point<int> position, int row)
 void EventTableModel::menuAnswered(int id, const std::vector<std::weak_ptr<EventBase>>& offered,
                                    juce::Point<int> position, const std::shared_ptr<EventBase>& clicked)
 {
-    std::unordered_set<std::shared_ptr<EventBase>> events;
-    for (const auto& event : offered)
-        events.insert(event.lock());
     const Events selected = getSelectedEvents();
-    // Another selection would be another menu. It may have been sorted meanwhile.
-    if (events != std::unordered_set<std::shared_ptr<EventBase>>(selected.begin(), selected.end()) ||
-        !EventMenu::allows(id, *m_list, m_dataModel.newEdl(), selected))
+    // Another selection would be another menu.
+    if (!areSame(offered, selected) || !EventMenu::allows(id, *m_list, m_dataModel.newEdl(), selected))
         return;
     if (id != EventMenu::Edit)
         edit(id, m_rows.rowOf(clicked));
@@ -434,7 +456,7 @@ void EventTableModel::changeList(int id, const Events& events, int row)
 {
     const bool keepsSelection = EventMenu::isExtending(id);
     const Life life = m_life;
-    const int next = rowAfterRemoval(events, row);
+    const int next = id == EventMenu::Delete ? rowAfterRemoval(events, row) : 0;
     try {
         const Silence silence(*this);
         if (!keepsSelection)

@@ -65,6 +65,8 @@ public:
     int getNumSelectedRows() const { return static_cast<int>(m_rows.selection().count()); }
     /// Selects these rows and no others. Tells nobody.
     void selectRows(const RowSet& rows);
+    /// Selects an event and no other, as the user does, and scrolls to it. False for one that isn't in the table.
+    bool selectEvent(const std::shared_ptr<core::EventBase>& event);
     /// As EventRows::withNeighbours.
     Events getSelectionWithNeighbours(const Events& selected, std::size_t& before, std::size_t& after) const
     {

@@ -201,13 +201,14 @@ void NewVideosDialog::setTrackHandler(VideoTrackHandlerBase* handler)
 
 void NewVideosDialog::tracksChanged()
 {
-    guardSystem([this] { showTracks(); });
+    showTracks();
 }
 
+/// One that can't be read stays as it is shown, and keeps no other from being shown.
 void NewVideosDialog::showTracks()
 {
     for (std::size_t channel = 0; channel < ChannelCount; ++channel)
-        showTrack(channel);
+        guardSystem([&] { showTrack(channel); });
 }
 
 void NewVideosDialog::showTrack(std::size_t channel)

@@ -201,20 +201,25 @@ void VideoDisplay::enablementChanged()
 
 void VideoDisplay::parentHierarchyChanged()
 {
-    guardSystem([this] { updatePictureSize(); });
+    updatePictureSize();
 }
 
 void VideoDisplay::updatePictureSize()
 {
-    if (!m_provider)
-        return;
-    const PixelSize size = VideoFrames::pixelsOf(m_oldImage.getWidth(), m_oldImage.getHeight(), pixelsForEachOf(*this));
-    m_provider->setImageSize(size.width, size.height);
+    guardSystem([this] {
+        if (!m_provider)
+            return;
+        const PixelSize size =
+            VideoFrames::pixelsOf(m_oldImage.getWidth(), m_oldImage.getHeight(), pixelsForEachOf(*this));
+        m_provider->setImageSize(size.width, size.height);
+    });
 }
 
 void VideoDisplay::paint(juce::Graphics& graphics)
 {
     guardSystem([&] {
+        // Of a window that is enlarged as a whole, JUCE tells its children nothing else.
+        updatePictureSize();
         graphics.fillAll(Background);
         const auto panel = getLocalBounds().reduced(2).toFloat();
         graphics.setColour(toColour(Palette::panel));

@@ -3,6 +3,7 @@
 #include "host/plugin/Cadrel.h"
 
 #include "core/notify/ChangeContext.h"
+#include "core/time/Timecode.h"
 #include "gui/main/MainGui.h"
 #include "host/Host.h"
 #include "host/border/HostFailure.h"
@@ -200,7 +201,16 @@ int32 Cadrel::createView(const char* name, FUnknown* /*parent*/, IPlugView** vie
         content->setNotifier(m_host.get());
         content->setVideoSource(m_video);
         content->onChange(core::DataModelChangeContext(m_host->getProjectModel()));
+        gui::MainGui& window = *content;
         m_view = makeCounted<JuceGuiAdapter>(std::move(content), m_context.get(), Counted<FObject>(m_host));
+        m_view->setChangeSelector([&window, &host = *m_host](double source, double destination) {
+            const auto clock = [&host](double time) {
+                core::Timecode timecode;
+                timecode.setSeconds(host.getTimeOrigin() + time);
+                return timecode;
+            };
+            return window.selectChange(clock(source), clock(destination));
+        });
         *view = Counted<JuceGuiAdapter>(m_view).detach();
     });
 }

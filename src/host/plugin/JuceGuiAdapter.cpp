@@ -20,6 +20,9 @@ using namespace Velmark;
 
 namespace {
 
+/// That of the content.
+const juce::Colour Background(0xff070c10);
+
 constexpr ViewRect MinimumRect{0, 0, JuceGuiAdapter::MinimumWidth, JuceGuiAdapter::MinimumHeight};
 
 int32 widthOf(const ViewRect& rect)
@@ -70,6 +73,7 @@ void JuceGuiAdapter::dispose() noexcept
     const juce::MessageManagerLock lock;
     leaveDesktop();
     resultOf([&] { removeChildComponent(m_content.get()); });
+    m_selectChange = {};
     m_content.reset();
     m_engine.reset();
 }
@@ -100,10 +104,12 @@ int32 JuceGuiAdapter::attached(void* parent, const char* type)
 
 void JuceGuiAdapter::attachTo(void* parent)
 {
+    // Without a server JUCE has no screen, and would make a window that isn't anywhere.
+    if (!juce::Desktop::getInstance().getDisplays().getPrimaryDisplay())
+        throw util::Result::HostObjectMissing;
     setVisible(true);
     removeFromDesktop();
     addToDesktop(0, parent);
-    // Without a server JUCE makes a window that isn't anywhere.
     if (!getPeer() || !getPeer()->getNativeHandle())
         throw util::Result::HostObjectMissing;
     setVisible(true);
@@ -215,6 +221,13 @@ int32 JuceGuiAdapter::checkSizeConstraint(ViewRect& rect)
     });
 }
 
+int32 JuceGuiAdapter::selectChange(double source, double destination)
+{
+    bool isSelected = false;
+    resultOf([&] { isSelected = m_selectChange && m_selectChange(source, destination); });
+    return isSelected ? ResultOk : ResultFalse;
+}
+
 double JuceGuiAdapter::scale()
 {
     return juce::Desktop::getInstance().getGlobalScaleFactor();
@@ -233,6 +246,12 @@ ViewRect JuceGuiAdapter::rectOnScreen(juce::Rectangle<int> size) const
         size = size.withSize(std::min(size.getWidth(), area.getWidth()), std::min(size.getHeight(), area.getHeight()));
     }
     return rectOf(size);
+}
+
+void JuceGuiAdapter::paint(juce::Graphics& graphics)
+{
+    // A content that is shown smaller may leave a part of the last pixels free.
+    graphics.fillAll(Background);
 }
 
 void JuceGuiAdapter::resized()

@@ -5,12 +5,15 @@
 #include "host/plugin/JuceLayer.h"
 #include "host/plugin/UnusedKeys.h"
 #include "velmark/CPluginView.h"
+#include "velmark/ChangeView.h"
 #include "velmark/FObject.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
+#include <functional>
 #include <memory>
 #include <optional>
+#include <utility>
 
 namespace Velmark {
 class IHostContext;
@@ -24,7 +27,7 @@ namespace cadrel::host {
 ///     window of the host > our X window (JUCE's) > this component > the content
 ///
 /// The content never gets less room than MinimumWidth x MinimumHeight; a smaller window shows it smaller.
-class JuceGuiAdapter final : public Velmark::Implements<JuceGuiAdapter, Velmark::CPluginView>,
+class JuceGuiAdapter final : public Velmark::Implements<JuceGuiAdapter, Velmark::CPluginView, Velmark::IChangeView>,
                              private JuceLayer,
                              public juce::Component {
 public:
@@ -37,6 +40,10 @@ public:
     JuceGuiAdapter(std::unique_ptr<juce::Component> content, Velmark::IHostContext* context,
                    Velmark::Counted<Velmark::FObject> engine);
     ~JuceGuiAdapter() override;
+
+    /// What selectChange does with its times; without it, it does nothing. It goes with the content.
+    using ChangeSelector = std::function<bool(double source, double destination)>;
+    void setChangeSelector(ChangeSelector selector) { m_selectChange = std::move(selector); }
 
     /// Takes the content away for good, with its window; what the host calls afterwards does nothing.
     void dispose() noexcept;
@@ -56,7 +63,9 @@ public:
     /// Makes it at least the minimum size, or the screen's where that is smaller.
     Velmark::int32 checkSizeConstraint(Velmark::ViewRect& rect) override;
     Velmark::int32 isPlatformTypeSupported(const char* type) override;
+    Velmark::int32 selectChange(double source, double destination) override;
 
+    void paint(juce::Graphics& graphics) override;
     void resized() override;
     void childBoundsChanged(juce::Component* child) override;
     /// What no component has used: undo and redo are the host's actions, Tab moves the keyboard, and the rest goes on to the
@@ -79,6 +88,7 @@ private:
     bool invokeEditAction(const char* action);
 
     std::unique_ptr<juce::Component> m_content; ///< null after its end
+    ChangeSelector m_selectChange;
     Velmark::IHostContext* m_context;
     Velmark::Counted<Velmark::FObject> m_engine;
     std::optional<UnusedKeys> m_unusedKeys; ///< while it is attached

@@ -16,6 +16,7 @@
 #include <stdexcept>
 #include <string>
 #include <thread>
+#include <utility>
 #include <vector>
 
 namespace desktop::tests {
@@ -65,6 +66,29 @@ protected:
     void willClickOnTheDesk()
     {
         will([this] { m_window.FocusedWindow::click(juce::Point<int>(20, 10)); });
+    }
+    /// Presses Return, which brings up a message over the file box, and then Return in that one.
+    void willBeTold(const std::string& message)
+    {
+        will([this, message] {
+            const auto laterActs = std::exchange(m_acts, {});
+            will([this, message] { EXPECT_EQ(shownMessage(), message); });
+            willPress(juce::KeyPress::returnKey);
+            m_acts.insert(m_acts.end(), laterActs.begin(), laterActs.end());
+            m_isActing = false;
+            m_window.getPeer()->handleKeyPress(juce::KeyPress(juce::KeyPress::returnKey));
+        });
+    }
+    std::string shownMessage() const
+    {
+        for (const juce::Component* const box : m_window.getChildren()) {
+            for (juce::Component* const child : box->getChildren()) {
+                if (const auto* const editor = dynamic_cast<juce::TextEditor*>(child);
+                    editor && editor->getName() == "Alert Message")
+                    return editor->getText().toStdString();
+            }
+        }
+        return {};
     }
     Files save(const std::string& extension = "edl")
     {
@@ -181,10 +205,23 @@ TEST_F(BoxesTest, OpenTheFileThatIsTyped)
 TEST_F(BoxesTest, StayOpenForAFileThatIsNotThere)
 {
     willType("cut.edl");
-    willPress(juce::KeyPress::returnKey);
-    will([this] { EXPECT_TRUE(m_boxes.isOpen()); });
+    willBeTold("There is no file " + (m_folder / "cut.edl").string() + ".");
     willPress(juce::KeyPress::escapeKey);
     EXPECT_EQ(open(), Files());
+}
+
+TEST_F(BoxesTest, TellWhereAFileCannotBeSaved)
+{
+    std::filesystem::create_directory(m_folder / "cut.edl");
+    willType("cut");
+    willBeTold("\"cut.edl\" is a folder. Choose another name.");
+    willPress(juce::KeyPress::escapeKey);
+    EXPECT_EQ(save(), Files());
+
+    willType("none/cut");
+    willBeTold("There is no folder " + (m_folder / "none").string() + ".");
+    willPress(juce::KeyPress::escapeKey);
+    EXPECT_EQ(save(), Files());
 }
 
 TEST_F(BoxesTest, AddTheExtensionToANameToBeSaved)

@@ -97,6 +97,20 @@ TEST_F(AutosaveTest, IsWrittenAtMostOnceInItsIntervalAndOnlyAfterAChange)
     EXPECT_TRUE(fs::exists(autosave));
 }
 
+TEST_F(AutosaveTest, DoesNotWaitForItsIntervalWhereThereWasNothingToWrite)
+{
+    OpenDocument& document = opened();
+    renameTrack(document, u"A");
+    renameTrack(document, u"DIA 1"); // as it was, by another way
+    idle();
+    EXPECT_FALSE(document.isUnsaved());
+    ASSERT_FALSE(fs::exists(autosave));
+
+    renameTrack(document, u"B");
+    idle(seconds(1));
+    EXPECT_TRUE(fs::exists(autosave));
+}
+
 TEST_F(AutosaveTest, IsNotWrittenWithinATransactionOrWhileIdleCallsAreBlocked)
 {
     OpenDocument& document = opened();

@@ -30,6 +30,16 @@ struct RandomUser : DocumentHost {
         return documents.open(folder / "reel3.stage");
     }
 
+    /// One in which something may have been done.
+    OpenDocument& openAndAct(Chance& chance)
+    {
+        OpenDocument& document = open(chance);
+        const std::uint64_t steps = chance.below(20);
+        for (std::uint64_t step = 0; step < steps; ++step)
+            act(document, chance);
+        return document;
+    }
+
     void act(OpenDocument& document, Chance& chance)
     {
         Project& project = document.project();
@@ -108,10 +118,7 @@ RC_GTEST_PROP(DocumentLaw, WhatIsSavedOpensAgainWithTheSameBytesAndIsSaved, ())
 {
     CheckedChance chance;
     RandomUser user;
-    OpenDocument& document = user.open(chance);
-    const std::uint64_t steps = chance.below(20);
-    for (std::uint64_t step = 0; step < steps; ++step)
-        user.act(document, chance);
+    OpenDocument& document = user.openAndAct(chance);
     const std::string stored = user.saved(document);
     const fs::path path = document.path();
     user.documents.close(document);
@@ -127,10 +134,7 @@ RC_GTEST_PROP(DocumentLaw, TheAutosaveOpensWithTheBytesOfTheProjectWhereThoseDif
 {
     CheckedChance chance;
     RandomUser user;
-    OpenDocument& document = user.open(chance);
-    const std::uint64_t steps = chance.below(20);
-    for (std::uint64_t step = 0; step < steps; ++step)
-        user.act(document, chance);
+    OpenDocument& document = user.openAndAct(chance);
     user.idle();
     user.idle();
     const fs::path path = document.path();

@@ -2,9 +2,9 @@
 
 // What the mark of unsaved work costs where the bytes of the project cost much.
 
-#include "standin/project/ClipEvent.h"
 #include "tests/desktop/document/DocumentHost.h"
 #include "tests/support/SecondsOf.h"
+#include "tests/support/standin/ManyClips.h"
 
 #include <algorithm>
 #include <functional>
@@ -32,15 +32,7 @@ protected:
     {
         standin::ChangeLog log;
         const auto project = Velmark::makeCounted<Project>(log);
-        for (int number = 0; number < Tracks; ++number) {
-            const auto track = Track::create(Track::Kind::Audio);
-            for (int clip = 0; clip < Clips; ++clip) {
-                const auto event = Velmark::makeCounted<standin::ClipEvent>();
-                event->setSpan(clip, clip + 1.0);
-                event->insertInto(*track);
-            }
-            track->insertInto(*project);
-        }
+        standin::tests::addManyClips(*project, Tracks, Clips);
         standin::ProjectFile::write(*project, folder / "film.stage");
         return documents.open(folder / "film.stage");
     }

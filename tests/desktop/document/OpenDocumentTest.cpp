@@ -333,7 +333,7 @@ TEST_F(OpenDocumentTest, TellsThatTheFolderIsGone)
     EXPECT_EQ(answer.message, file.string() + ": its folder is no longer there");
     const SaveAnswer again = documents.overwrite(document);
     EXPECT_EQ(again.state, State::Failed);
-    EXPECT_EQ(again.message, file.string() + ": the folder does not exist");
+    EXPECT_EQ(again.message, file.string() + ": the folder does not exist; make it or give another");
     EXPECT_TRUE(document.isUnsaved());
 }
 
@@ -349,7 +349,7 @@ TEST_F(OpenDocumentTest, TellsThatTheFileIsWriteProtected)
     const SaveAnswer answer = documents.save(document);
 
     EXPECT_EQ(answer.state, State::Failed);
-    EXPECT_EQ(answer.message, file.string() + ": is protected against writing");
+    EXPECT_EQ(answer.message, file.string() + ": is protected against writing; give another name");
     EXPECT_EQ(contentOf(file), before);
     EXPECT_TRUE(document.isUnsaved());
 }
@@ -366,7 +366,7 @@ TEST_F(OpenDocumentTest, TellsThatTheFolderIsWriteProtected)
     const SaveAnswer answer = documents.save(document);
 
     EXPECT_EQ(answer.state, State::Failed);
-    EXPECT_EQ(answer.message, file.string() + ": you may not write into the folder");
+    EXPECT_EQ(answer.message, file.string() + ": you may not write into the folder; give another folder");
     EXPECT_EQ(contentOf(file), before);
 }
 
@@ -382,11 +382,44 @@ TEST_F(OpenDocumentTest, TellsThatTheDiskIsFullAndLeavesTheFormerFile)
         answer = documents.save(document);
     }
     EXPECT_EQ(answer.state, State::Failed);
-    EXPECT_EQ(answer.message, file.string() + ": can't be written; see whether the disk is full");
+    EXPECT_EQ(answer.message, file.string() +
+                                  ": can't be written; see whether the disk is full, or save it on another disk "
+                                  "with Save As");
     EXPECT_EQ(contentOf(file), before);
     EXPECT_EQ(folder.names(), names);
     EXPECT_TRUE(document.isUnsaved());
     EXPECT_TRUE(documents.save(document).isSaved());
+}
+
+TEST_F(OpenDocumentTest, TellsOnAFullDiskWhereTheWorkIsKept)
+{
+    OpenDocument& document = opened();
+    const auto messageOnAFullDisk = [&] {
+        const FileSizeLimit full(10);
+        return documents.save(document).message;
+    };
+    const std::string kept = ". Until then the work is kept in " + file.string() + ".autosave";
+    renameTrack(document, u"FX 1");
+    idle();
+    EXPECT_TRUE(messageOnAFullDisk().ends_with(kept));
+    EXPECT_EQ(Autosave::read(file)->content, bytesOf(document));
+
+    renameTrack(document, u"FX 2");
+    EXPECT_FALSE(messageOnAFullDisk().ends_with(kept)) << "The autosave isn't that of the present work.";
+}
+
+TEST_F(OpenDocumentTest, IsNotSavedAsItsOwnFileInSilenceWhenAnotherProgramHasChangedThat)
+{
+    OpenDocument& document = opened();
+    renameTrack(document, u"FX 1");
+    const std::string foreign = contentOf(writeProject("reel3.stage", 3));
+
+    EXPECT_EQ(documents.saveAs(document, file).state, State::Changed);
+    EXPECT_EQ(contentOf(file), foreign);
+
+    fs::remove(file);
+    EXPECT_TRUE(documents.saveAs(document, file).isSaved());
+    EXPECT_EQ(contentOf(file), bytesOf(document));
 }
 
 TEST_F(OpenDocumentTest, SavesAsAnotherFileThatIsItsOwnFromThenOn)

@@ -5,6 +5,7 @@
 #include "desktop/document/DocumentError.h"
 #include "desktop/document/RecentFiles.h"
 #include "tests/desktop/document/DocumentHost.h"
+#include "tests/support/FileSizeLimit.h"
 
 #include "standin/edit/ProjectManager.h"
 #include "tests/standin/ardour/SessionText.h"
@@ -242,18 +243,178 @@ TEST_F(OpenDocumentsTest, RemembersWhatWasOpenedAndSaved)
     EXPECT_EQ(names, (std::vector<std::string>{"a.stage", "c.stage", "b.stage"}));
 }
 
+TEST_F(OpenDocumentsTest, TellWhatCanBeDoneWhereASessionCannotBeOpened)
+{
+    fs::create_directory(folder / "film");
+    for (const char* const name : {"a.ardour", "b.ardour"})
+        writeFile(folder / "film" / name, std::string(SessionText()));
+    writeFile(folder / "film" / "a.pending", "<Session/>");
+    const auto messageOf = [&](const fs::path& path) -> std::string {
+        try {
+            documents.open(path);
+        } catch (const DocumentError& error) {
+            return error.what();
+        }
+        return "none";
+    };
+    EXPECT_TRUE(messageOf(folder / "film").ends_with("holds several sessions; name one of them"))
+        << messageOf(folder / "film");
+    EXPECT_NE(messageOf(folder / "film" / "a.ardour").find("; open the session in Ardour and save it, or remove"),
+              std::string::npos)
+        << messageOf(folder / "film" / "a.ardour");
+}
+
 TEST_F(OpenDocumentsTest, LeaveNoLockAndNoAutosaveWhenAllAreClosed)
 {
-    {
-        OpenDocuments others(application);
-        for (const char* const name : {"a.stage", "b.stage"}) {
-            renameTrack(others.open(writeProject(name)), u"FX 1");
-            others.idle();
-        }
-        EXPECT_EQ(folder.names().size(), 6U);
+    OpenDocuments others(application);
+    for (const char* const name : {"a.stage", "b.stage"}) {
+        renameTrack(others.open(writeProject(name)), u"FX 1");
+        others.idle();
     }
+    EXPECT_EQ(folder.names().size(), 6U);
+    while (others.size() > 0)
+        others.close(others.at(0));
     EXPECT_EQ(folder.names(), (std::vector<std::string>{"a.stage", "b.stage"}));
     EXPECT_TRUE(application.projects().projects().empty());
+}
+
+TEST_F(OpenDocumentsTest, LeaveTheAutosavesOfThoseThatNobodyHasClosed)
+{
+    try {
+        OpenDocuments others(application);
+        renameTrack(others.open(writeProject("a.stage")), u"FX 1");
+        others.idle();
+        throw std::runtime_error("a fault of the program");
+    } catch (const std::runtime_error&) {
+        EXPECT_EQ(folder.names(), (std::vector<std::string>{"a.stage", "a.stage.autosave"}));
+    }
+    EXPECT_TRUE(application.projects().projects().empty());
+    EXPECT_TRUE(documents.look(folder / "a.stage").unsavedWork);
+}
+
+// What was unsaved when a file is loaded anew.
+
+TEST_F(OpenDocumentsTest, KeepUnsavedWorkUnderANameOfItsOwnWhenItsFileIsReloaded)
+{
+    OpenDocument& a = opened("a.stage");
+    renameTrack(a, u"FX 1");
+    idle();
+    renameTrack(a, u"FX 2");
+    const std::string bytes = bytesOf(a);
+    const fs::path aside = Autosave::asidePathFor(a.path());
+    EXPECT_EQ(aside.filename(), "a.stage.autosave-1");
+    writeProject("a.stage", 2);
+
+    OpenDocument& reloaded = documents.reload(a);
+
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{".a.stage.cadrel-lock", "a.stage", "a.stage.autosave-1"}));
+    EXPECT_EQ(Autosave::asidePathFor(reloaded.path()).filename(), "a.stage.autosave-2");
+    // As the user can do by hand.
+    fs::rename(aside, Autosave::pathFor(reloaded.path()));
+    EXPECT_EQ(Autosave::read(reloaded.path())->content, bytes);
+}
+
+TEST_F(OpenDocumentsTest, KeepNothingAsideWhenAFileIsReloadedWithoutUnsavedWork)
+{
+    OpenDocument& a = opened("a.stage");
+    writeProject("a.stage", 2);
+    documents.reload(a);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{".a.stage.cadrel-lock", "a.stage"}));
+}
+
+TEST_F(OpenDocumentsTest, ReloadNothingWhereUnsavedWorkCannotBeKept)
+{
+    OpenDocument& a = opened("a.stage");
+    renameTrack(a, u"FX 1");
+    writeProject("a.stage", 2);
+    {
+        const cadrel::tests::FileSizeLimit full(10);
+        EXPECT_THROW(documents.reload(a), DocumentError);
+    }
+    EXPECT_EQ(tabs(), "[a.stage]");
+    EXPECT_EQ(trackOf(a).name(), u"FX 1");
+    EXPECT_TRUE(a.isUnsaved());
+    EXPECT_EQ(application.projects().projects().size(), 1U);
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{".a.stage.cadrel-lock", "a.stage"}));
+}
+
+// When the system ends the program, and while a box is open.
+
+TEST_F(OpenDocumentsTest, WriteAllUnsavedWorkAtOnceWhenTheProgramHasToEnd)
+{
+    for (const char* const name : {"a.stage", "b.stage", "c.stage"})
+        opened(name);
+    for (const std::size_t index : {0U, 1U})
+        renameTrack(documents.at(index), u"FX 1");
+    idle();
+    renameTrack(documents.at(0), u"FX 2");
+    const std::string kept = contentOf(Autosave::pathFor(documents.at(1).path()));
+    module->models[&documents.at(2).project()] = "settings that nobody has stored";
+    const int storings = module->storings;
+
+    documents.leave(false);
+
+    EXPECT_EQ(Autosave::read(documents.at(0).path())->content, standin::ProjectFile::toText(documents.at(0).project()));
+    EXPECT_EQ(contentOf(Autosave::pathFor(documents.at(1).path())), kept);
+    EXPECT_EQ(module->storings, storings) << "A module could open a box.";
+    EXPECT_EQ(folder.names(),
+              (std::vector<std::string>{"a.stage", "a.stage.autosave", "b.stage", "b.stage.autosave", "c.stage"}));
+}
+
+TEST_F(OpenDocumentsTest, AskTheModulesForWhatTheyHaveWhenTheProgramHasToEndWithoutABox)
+{
+    OpenDocument& a = opened("a.stage");
+    idle();
+    module->models[&a.project()] = "settings";
+
+    documents.leave(true);
+
+    ASSERT_TRUE(Autosave::read(a.path()));
+    EXPECT_NE(Autosave::read(a.path())->content.find("settings"), std::string::npos);
+}
+
+TEST_F(OpenDocumentsTest, WriteNothingWithinATransactionWhenTheProgramHasToEnd)
+{
+    OpenDocument& a = opened("a.stage");
+    edit(a.project(), u"Rename", [&] {
+        trackOf(a).setName(u"half");
+        documents.leave(true);
+    });
+    EXPECT_EQ(folder.names(), (std::vector<std::string>{"a.stage"}));
+}
+
+TEST_F(OpenDocumentsTest, LeaveTheAutosaveOfAnotherProgramAsItIsWhenTheProgramHasToEnd)
+{
+    const fs::path file = fs::canonical(writeProject("a.stage"));
+    const DocumentLock other(file);
+    OpenDocument& a = documents.open(file);
+    renameTrack(a, u"FX 1");
+
+    documents.leave(true);
+
+    EXPECT_FALSE(fs::exists(Autosave::pathFor(file)));
+    EXPECT_TRUE(DocumentLock::holderOf(file));
+}
+
+TEST_F(OpenDocumentsTest, AutosaveBeneathABoxWithoutCallingAnyModule)
+{
+    OpenDocument& a = opened("a.stage");
+    renameTrack(a, u"FX 1");
+    const int storings = module->storings;
+
+    documents.idleBeneathBox(now += std::chrono::minutes(1));
+
+    ASSERT_TRUE(Autosave::read(a.path()));
+    EXPECT_EQ(Autosave::read(a.path())->content, standin::ProjectFile::toText(a.project()));
+    const std::string first = contentOf(Autosave::pathFor(a.path()));
+    renameTrack(a, u"FX 2");
+    documents.idleBeneathBox(now += std::chrono::seconds(29));
+    EXPECT_EQ(contentOf(Autosave::pathFor(a.path())), first);
+    edit(a.project(), u"FX 3", [&] { documents.idleBeneathBox(now += std::chrono::minutes(1)); });
+    EXPECT_EQ(contentOf(Autosave::pathFor(a.path())), first);
+    documents.idleBeneathBox(now += std::chrono::seconds(1));
+    EXPECT_NE(contentOf(Autosave::pathFor(a.path())), first);
+    EXPECT_EQ(module->storings, storings);
 }
 
 } // namespace desktop::tests

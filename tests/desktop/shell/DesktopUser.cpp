@@ -3,6 +3,12 @@
 #include "tests/desktop/shell/DesktopUser.h"
 
 #include "desktop/shell/ShellLayout.h"
+#include "desktop/shell/WindowMemory.h"
+#include "desktop/tracks/RowLayout.h"
+#include "desktop/tracks/TimeRuler.h"
+#include "desktop/tracks/TimeScale.h"
+#include "desktop/tracks/TrackHeaders.h"
+#include "desktop/tracks/TrackIndex.h"
 #include "tests/module/MainStills.h"
 #include "tests/support/TreePaths.h"
 #include "tests/support/x11/XDrag.h"
@@ -14,6 +20,9 @@
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
+#include <fstream>
+#include <iterator>
+#include <sstream>
 #include <stdexcept>
 #include <thread>
 #include <utility>
@@ -33,8 +42,23 @@ constexpr int TracksHeight = 300;
 constexpr int Height =
     ShellLayout::MenuHeight + ShellLayout::TabHeight + TracksHeight + ShellLayout::DividerHeight + ModuleHeight;
 
-pid_t startProgram(const std::filesystem::path& home, const std::vector<std::string>& arguments)
+/// Or a window that is larger than the screen would come up maximised, and couldn't be resized.
+void rememberSize(const std::filesystem::path& home)
 {
+    const std::filesystem::path file = home / "state/cadrel/window.json";
+    if (std::filesystem::exists(file))
+        return;
+    std::filesystem::create_directories(file.parent_path());
+    WindowForm form;
+    form.width = Width;
+    form.height = Height;
+    WindowMemory(file).keep(form);
+}
+
+pid_t startProgram(const std::filesystem::path& home, const std::vector<std::string>& arguments, DesktopUser::Size size)
+{
+    if (size == DesktopUser::Size::OfPlaces)
+        rememberSize(home);
     std::string program = cadrel::tests::programPath("cadrel");
     std::vector<std::string> texts{program, "open"};
     texts.insert(texts.end(), arguments.begin(), arguments.end());
@@ -91,8 +115,8 @@ std::string nameOf(Display* display, Window window)
 } // namespace
 
 DesktopUser::DesktopUser(const std::filesystem::path& home, const std::vector<std::string>& arguments,
-                         unsigned long answer)
-    : m_display(XOpenDisplay(nullptr)), m_process(startProgram(home, arguments))
+                         unsigned long answer, Size size)
+    : m_display(XOpenDisplay(nullptr)), m_process(startProgram(home, arguments, size))
 {
     XSetErrorHandler(passOver);
     waitFor("the window is there", [this] {
@@ -104,14 +128,16 @@ DesktopUser::DesktopUser(const std::filesystem::path& home, const std::vector<st
     waitFor("Cadrel's window is in it", [&, turns = 0]() mutable {
         const auto children = childrenOf(m_display, m_window);
         // Not every window manager takes the first wish of a window that it has only just framed.
-        XResizeWindow(m_display, m_window, Width, Height);
+        if (size == Size::OfPlaces)
+            XResizeWindow(m_display, m_window, Width, Height);
         if (children.empty() && answer != 0 && ++turns % TurnsBetweenKeys == 0)
             press(answer);
         XWindowAttributes attributes;
         if (children.empty() || XGetWindowAttributes(m_display, children.front(), &attributes) == 0)
             return false;
         m_container = children.front();
-        return attributes.map_state == IsViewable && attributes.width == Width && attributes.height == ModuleHeight;
+        const bool hasSize = attributes.width == Width && attributes.height == ModuleHeight;
+        return attributes.map_state == IsViewable && (size == Size::Own || hasSize);
     });
 }
 
@@ -190,6 +216,42 @@ void DesktopUser::clickBesideTheBox()
     m_user.click();
 }
 
+DesktopUser::Pixel DesktopUser::trackPixel(const standin::Project& project, std::size_t row, double seconds) const
+{
+    constexpr int ScrollBar = 12;
+    constexpr int IntoTheRow = 6;
+    const TrackIndex index(project);
+    const RowLayout rows(index.rows(), RowLayout::Size::Medium);
+    TimeScale scale;
+    scale.fit(index.programme()->start, index.programme()->end, Width - TrackHeaders::Width - ScrollBar);
+    const Pixel origin = originOf(m_window);
+    return {origin.x + TrackHeaders::Width + static_cast<int>(scale.pixelAt(seconds)),
+            origin.y + ShellLayout::of(Height, -1).tracksTop + TimeRuler::Height + rows.top(row) + IntoTheRow};
+}
+
+void DesktopUser::clickTrack(const standin::Project& project, std::size_t row, double seconds)
+{
+    const Pixel place = trackPixel(project, row, seconds);
+    m_user.moveTo(place.x, place.y);
+    m_user.click();
+}
+
+unsigned long DesktopUser::trackColour(const standin::Project& project, std::size_t row, double seconds) const
+{
+    const Pixel place = trackPixel(project, row, seconds);
+    return m_windows.colourAt(place.x, place.y);
+}
+
+void DesktopUser::clickTab(int tab)
+{
+    constexpr int TabWidth = 240;
+    constexpr int IntoTheTab = 60;
+    const Pixel origin = originOf(m_window);
+    m_user.moveTo(origin.x + tab * TabWidth + IntoTheTab,
+                  origin.y + ShellLayout::MenuHeight + ShellLayout::TabHeight / 2);
+    m_user.click();
+}
+
 void DesktopUser::clickChangeEvent(int row)
 {
     const WindowPlaces::Place first = m_places.at(Main, "Change Table List Box Row");
@@ -259,6 +321,75 @@ void DesktopUser::closeWindow()
     XSync(m_display, False);
 }
 
+void DesktopUser::sendToManager(const char* message, long first, long second, long third)
+{
+    XEvent event = {};
+    event.xclient.type = ClientMessage;
+    event.xclient.window = m_window;
+    event.xclient.message_type = XInternAtom(m_display, message, False);
+    event.xclient.format = 32;
+    event.xclient.data.l[0] = first;
+    event.xclient.data.l[1] = second;
+    event.xclient.data.l[2] = third;
+    XSendEvent(m_display, DefaultRootWindow(m_display), False, SubstructureRedirectMask | SubstructureNotifyMask,
+               &event);
+    XSync(m_display, False);
+}
+
+void DesktopUser::switchMaximised()
+{
+    constexpr long Switch = 2;
+    const Area before = area();
+    sendToManager("_NET_WM_STATE", Switch,
+                  static_cast<long>(XInternAtom(m_display, "_NET_WM_STATE_MAXIMIZED_HORZ", False)),
+                  static_cast<long>(XInternAtom(m_display, "_NET_WM_STATE_MAXIMIZED_VERT", False)));
+    waitFor("the window has another size", [&] { return area().height != before.height; });
+    waitForRest(20);
+}
+
+void DesktopUser::resizeTo(int width, int height)
+{
+    waitForRest(20);
+    XResizeWindow(m_display, m_window, static_cast<unsigned>(width), static_cast<unsigned>(height));
+    waitFor("the window has its size", [&] { return area().width == width && area().height == height; });
+    waitForRest(20);
+}
+
+void DesktopUser::dragDivider(int distance)
+{
+    const Area module = moduleArea();
+    const int x = module.x + module.width / 2;
+    const int y = module.y - ShellLayout::DividerHeight / 2 - 1;
+    m_user.moveTo(x, y);
+    m_user.dragTo(x, y + distance);
+    waitFor("the line is dragged", [&] { return moduleArea().y == module.y + distance; });
+}
+
+DesktopUser::Area DesktopUser::areaOf(unsigned long window) const
+{
+    XWindowAttributes attributes = {};
+    XGetWindowAttributes(m_display, window, &attributes);
+    const Pixel origin = originOf(window);
+    return {origin.x, origin.y, attributes.width, attributes.height};
+}
+
+DesktopUser::Area DesktopUser::frame() const
+{
+    for (Window window = m_window;;) {
+        Window root = 0;
+        Window parent = 0;
+        Window* children = nullptr;
+        unsigned count = 0;
+        if (XQueryTree(m_display, window, &root, &parent, &children, &count) == 0)
+            throw std::runtime_error("the window has gone");
+        if (children)
+            XFree(children);
+        if (parent == root)
+            return areaOf(window);
+        window = parent;
+    }
+}
+
 void DesktopUser::waitForRest(int turns)
 {
     std::vector<char> shown;
@@ -318,6 +449,27 @@ bool DesktopUser::isRunning()
 void DesktopUser::killProgram() const
 {
     kill(m_process, SIGKILL);
+}
+
+void DesktopUser::signalProgram(int signal) const
+{
+    kill(m_process, signal);
+}
+
+double DesktopUser::processorSeconds() const
+{
+    std::ifstream file("/proc/" + std::to_string(m_process) + "/stat");
+    std::string text((std::istreambuf_iterator<char>(file)), {});
+    // The name stands in parentheses and may hold blanks; the time of the program and of the system for it are the 12th and
+    // 13th after it.
+    std::istringstream fields(text.substr(text.rfind(')') + 1));
+    std::string passedOver;
+    for (int field = 0; field < 11; ++field)
+        fields >> passedOver;
+    double own = 0.0;
+    double system = 0.0;
+    fields >> own >> system;
+    return (own + system) / static_cast<double>(sysconf(_SC_CLK_TCK));
 }
 
 int DesktopUser::status()

@@ -16,20 +16,28 @@
 
 struct _XDisplay;
 
+namespace standin {
+class Project;
+} // namespace standin
+
 namespace desktop::tests {
 
 /// The desktop program in a process of its own, and a user in front of it with mouse and keyboard. The window gets a size in which
 /// Cadrel's has its smallest one, so that its controls stand where WindowPlaces says. Everything that doesn't come about within
-/// ten seconds, or before the program ends, throws std::runtime_error.
+/// thirty seconds, or before the program ends, throws std::runtime_error.
 class DesktopUser {
 public:
+    /// Whether the window gets the size in which controls can be found, or keeps the one that the program has given it.
+    enum class Size { OfPlaces, Own };
+
     static constexpr const char* Main = "";
     static constexpr const char* Files = "m_fileDialog";
     static constexpr const char* Videos = "m_videosDialog";
 
     /// Starts the program on the screen of the environment, with its state in the folder `home`, and waits for its window and
     /// for Cadrel's. `answer` is the key that a question before that is answered with, or 0.
-    DesktopUser(const std::filesystem::path& home, const std::vector<std::string>& arguments, unsigned long answer = 0);
+    DesktopUser(const std::filesystem::path& home, const std::vector<std::string>& arguments, unsigned long answer = 0,
+                Size size = Size::OfPlaces);
     DesktopUser(const DesktopUser&) = delete;
     DesktopUser& operator=(const DesktopUser&) = delete;
     /// Kills the program if it still runs.
@@ -40,6 +48,12 @@ public:
     void doubleClick(const std::string& sheet, const std::string& name, std::chrono::milliseconds pause);
     /// On the tracks at their left edge, over which a box lies, but not its panel.
     void clickBesideTheBox();
+    /// At a place of the tracks of which all is shown, in the row with that index; in seconds of the project.
+    void clickTrack(const standin::Project& project, std::size_t row, double seconds);
+    /// What stands there in the band with the names of clips, as 0xRRGGBB.
+    unsigned long trackColour(const standin::Project& project, std::size_t row, double seconds) const;
+    /// On the name of a project, counted from 0.
+    void clickTab(int tab);
     /// On an event of the change list, counted from 0.
     void clickChangeEvent(int row);
     /// In the second row of the videos, below the title of a column.
@@ -56,6 +70,22 @@ public:
     void type(const std::string& text) { m_user.type(text); }
     /// As a window manager does it for the user.
     void closeWindow();
+    void resizeTo(int width, int height);
+    void switchMaximised();
+    /// From where it is to a place so many pixels lower.
+    void dragDivider(int distance);
+
+    struct Area {
+        int x;
+        int y;
+        int width;
+        int height;
+    };
+    /// Of the window, and of the frame that a window manager has put around it; on the screen.
+    Area area() const { return areaOf(m_window); }
+    Area frame() const;
+    /// Of Cadrel's window.
+    Area moduleArea() const { return areaOf(m_container); }
 
     /// Writes what the window shows to the folder `window` of the build, when it has come to rest. Without a window manager.
     void picture(const std::string& name);
@@ -63,6 +93,8 @@ public:
     /// Waits until Cadrel's window shows both stills with these numbers in their bars.
     void waitForStills(int oldNumber, int newNumber);
 
+    /// What the window shows.
+    std::vector<char> pixels() const { return m_windows.pixelsOf(m_window); }
     /// Until what the window shows has stayed the same for so many turns of ten milliseconds or more.
     void waitForRest(int turns);
     std::string title() const;
@@ -73,7 +105,11 @@ public:
     void save();
     /// At once, from any thread.
     void killProgram() const;
-    /// Waits for the end of the program and answers its exit status.
+    /// As the system does when the user logs out.
+    void signalProgram(int signal) const;
+    /// The time of the processors that the program has taken so far, in seconds.
+    double processorSeconds() const;
+    /// Waits for the end of the program and answers its exit status; -1 where a signal has ended it.
     int status();
     bool isRunning();
 
@@ -86,6 +122,9 @@ private:
         int y;
     };
     Pixel originOf(unsigned long window) const;
+    Pixel trackPixel(const standin::Project& project, std::size_t row, double seconds) const;
+    Area areaOf(unsigned long window) const;
+    void sendToManager(const char* message, long first, long second, long third);
     Pixel middleOf(const cadrel::tests::WindowPlaces::Place& place) const;
     void clickAt(const cadrel::tests::WindowPlaces::Place& place);
 

@@ -97,12 +97,15 @@ TEST(Menus, ListRecentFilesAndTheCommandsOfModules)
 {
     MenuState state;
     state.hasProject = true;
-    state.recentFiles = {"/film/b.stage", "/film/a.stage"};
+    state.recentFiles = {{"/film/b.stage", false}, {"/film/a.stage", true}};
     state.moduleCommands = {u"Cadrel"};
     const auto menus = menusOf(state);
     const auto recent = itemNamed(menus[0].items, "Open Recent").items;
-    EXPECT_EQ(textsOf(recent), state.recentFiles);
+    EXPECT_EQ(textsOf(recent),
+              (std::vector<std::string>{"/film/b.stage", "/film/a.stage (missing)", "", "Clear This List"}));
     EXPECT_EQ(recent[1].command, MenuCommand::FirstRecent + 1);
+    EXPECT_TRUE(recent[1].isEnabled) << "It can be taken off the list.";
+    EXPECT_EQ(recent[3].command, MenuCommand::ClearRecent);
     EXPECT_EQ(itemNamed(menus[3].items, "Cadrel").command, MenuCommand::FirstOfModules);
 }
 

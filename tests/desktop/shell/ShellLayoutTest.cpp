@@ -23,11 +23,14 @@ TEST(ShellLayout, GivesTheModuleTheHeightThatItWantsAndTheTracksWhatIsLeft)
 
 TEST(ShellLayout, KeepsSomeTracksInSightOnASmallScreen)
 {
-    EXPECT_EQ(ShellLayout::of(Rest + 260 + 750, -1).tracksHeight, 260);
-    EXPECT_EQ(ShellLayout::of(Rest + 259 + 750, -1).tracksHeight, 260);
-    EXPECT_EQ(ShellLayout::of(Rest + 600, -1).tracksHeight, 260);
-    EXPECT_EQ(ShellLayout::of(Rest + 600, -1).moduleHeight, 340);
-    EXPECT_EQ(ShellLayout::of(Rest + 400, -1).tracksHeight, 200) << "The module has 200 at least.";
+    EXPECT_EQ(ShellLayout::of(Rest + 261 + 750, -1).tracksHeight, 261);
+    // A quarter, while that is less than 260.
+    EXPECT_EQ(ShellLayout::of(Rest + 1000, -1).tracksHeight, 250);
+    EXPECT_EQ(ShellLayout::of(Rest + 600, -1).tracksHeight, 150);
+    EXPECT_EQ(ShellLayout::of(Rest + 600, -1).moduleHeight, 450);
+    EXPECT_EQ(ShellLayout::of(Rest + 476, -1).tracksHeight, 120) << "The tracks have 120 at least.";
+    EXPECT_EQ(ShellLayout::of(Rest + 300, -1).tracksHeight, 120);
+    EXPECT_EQ(ShellLayout::of(Rest + 300, -1).moduleHeight, 180);
 }
 
 TEST(ShellLayout, FollowsTheUserAsFarAsBothStayUsable)

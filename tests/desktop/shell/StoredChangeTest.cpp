@@ -18,6 +18,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <utility>
+#include <vector>
+
 namespace desktop::tests {
 namespace {
 
@@ -63,6 +69,22 @@ TEST_F(StoredChangeTest, IsReadAgainOnlyWhenItIsAnother)
     m_model.changeEdl().clear();
     EXPECT_TRUE(store());
     EXPECT_TRUE(m_change.map().isEmpty());
+}
+
+TEST_F(StoredChangeTest, PassesOverWhateverBlockSomebodyHasMade)
+{
+    using cadrel::tests::StoredModel;
+    const std::vector<std::uint8_t> whole = StoredModel::of(m_model).block;
+    for (std::size_t place = 0; place + 4 <= whole.size(); ++place) {
+        // As a count it is more than there is memory for.
+        std::vector<std::uint8_t> block = whole;
+        std::fill_n(block.begin() + static_cast<std::ptrdiff_t>(place), 3, std::uint8_t{0xFF});
+        block[place + 3] = 0x7F;
+        StoredModel::ofBlock(std::move(block)).putInto(m_project);
+        EXPECT_NO_THROW(m_change.look(m_project)) << "at byte " << place;
+    }
+    EXPECT_TRUE(store());
+    EXPECT_EQ(m_change.map().isEmpty(), false);
 }
 
 TEST_F(StoredChangeTest, IsPlannedUntilARunWasNoted)

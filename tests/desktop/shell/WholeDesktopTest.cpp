@@ -8,6 +8,9 @@
 #include "core/time/Framerate.h"
 #include "core/time/Timecode.h"
 #include "desktop/document/Autosave.h"
+#include "desktop/document/DocumentLock.h"
+#include "desktop/tracks/TrackIndex.h"
+#include "gui/look/Palette.h"
 #include "gui/table/StoredTable.h"
 #include "standin/Application.h"
 #include "standin/project/Project.h"
@@ -61,6 +64,8 @@ constexpr double NewStart = 64.0 + 21.0 / 24.0;
 /// Its copy in the preview.
 constexpr double PreviewStart = 24.0 * 60.0 * 60.0 + NewStart;
 constexpr double SameInstant = 1.0 / 384000;
+/// The name of a clip that the selected event moves.
+constexpr unsigned long Marked = cadrel::gui::Palette::selection.argb & 0xffffffUL;
 
 /// The four of each event, in the order of the list.
 std::vector<std::string> timecodesOf(const core::EventList& list)
@@ -175,10 +180,11 @@ protected:
         model.generateChangeEdl();
         return timecodesOf(model.changeEdl());
     }
-    std::unique_ptr<core::DataModel> storedModel()
+    std::unique_ptr<core::DataModel> storedModel() const { return storedModel(m_file); }
+    static std::unique_ptr<core::DataModel> storedModel(const fs::path& file)
     {
         auto model = std::make_unique<core::DataModel>();
-        auto archive = cadrel::tests::archiveOf(cadrel::tests::StoredModel::inFile(m_file).value().block);
+        auto archive = cadrel::tests::archiveOf(cadrel::tests::StoredModel::inFile(file).value().block);
         archive >> *model;
         return model;
     }
@@ -191,6 +197,26 @@ protected:
             .selection(static_cast<int>(model->changeEdl().size()))
             .forEach([&](int row) { rows.push_back(row); });
         return rows;
+    }
+    /// Selects another event, saves, and clicks into the clip that begins there on the first dialogue track; and saves again, when
+    /// the clip is marked.
+    void clickClip(double start)
+    {
+        constexpr double IntoTheClip = 4.0;
+        m_user->clickChangeEvent(4);
+        m_user->save();
+        EXPECT_EQ(selectedChangeEvents(), std::vector<int>{4});
+        standin::Application host;
+        const standin::Project& project = host.openProject(m_file);
+        std::size_t row = 0;
+        while (TrackIndex(project).rows().at(row).track->name() != u"DIA 1")
+            ++row;
+        m_user->waitForRest(20);
+        EXPECT_NE(m_user->trackColour(project, row, start + IntoTheClip), Marked);
+        m_user->clickTrack(project, row, start + IntoTheClip);
+        m_user->save();
+        m_user->waitForRest(20);
+        EXPECT_EQ(m_user->trackColour(project, row, start + IntoTheClip), Marked);
     }
     /// Whether a take of the clip begins there on the first dialogue track of the file, in seconds of the project.
     bool hasClipAt(double start)
@@ -363,6 +389,29 @@ TEST_P(WholeDesktopTest, GivesTheKeysToTheTableThatIsClickedAfterABoxWasOpen)
     EXPECT_EQ(selectedChangeEvents(), std::vector<int>{4});
 }
 
+TEST_P(WholeDesktopTest, SelectsTheEventThatMovesTheClipThatIsClickedBeforeAndAfterTheRun)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->save();
+    m_user->press('f');
+    clickClip(OldStart);
+    EXPECT_EQ(selectedChangeEvents(), std::vector<int>{2});
+    EXPECT_EQ(timecodesOf(storedModel()->changeEdl())[2], "03:00:33:03 03:01:13:23 03:00:31:19 03:01:12:15");
+
+    m_user->click(DesktopUser::Main, "Cadrel Button");
+    m_user->waitForBox(true);
+    m_user->press(XK_Return); // Keep
+    m_user->waitForBox(false);
+    m_user->save();
+    m_user->press('f');
+    // The run has left out the first event, which moves nothing.
+    clickClip(NewStart);
+    EXPECT_EQ(selectedChangeEvents(), std::vector<int>{1});
+    EXPECT_EQ(timecodesOf(storedModel()->changeEdl())[1], "03:00:33:03 03:01:13:23 03:00:31:19 03:01:12:15");
+}
+
 TEST_P(WholeDesktopTest, GivesTheKeysToAQuestionHoweverItWasClickedFor)
 {
     start();
@@ -391,6 +440,65 @@ TEST_P(WholeDesktopTest, GivesTheKeysToAQuestionHoweverItWasClickedFor)
     m_user->waitForBox(false);
     m_user->save();
     EXPECT_TRUE(isConformed());
+}
+
+TEST_P(WholeDesktopTest, ShowsNothingOfABoxBeneathTheNextOne)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->waitForTitle("there is unsaved work", [](const std::string& text) { return text.starts_with("*"); });
+    std::vector<std::vector<char>> pictures;
+    for (const bool isRightAfter : {false, true}) {
+        m_user->waitForRest(40);
+        m_user->click(DesktopUser::Main, "Cadrel Button");
+        m_user->waitForBox(true);
+        m_user->waitForRest(20);
+        if (isRightAfter)
+            m_user->closeWindow();
+        m_user->press(XK_Escape);
+        if (!isRightAfter) {
+            m_user->waitForBox(false);
+            m_user->waitForRest(40);
+            m_user->closeWindow();
+            m_user->waitForBox(true);
+        }
+        m_user->waitForRest(40);
+        pictures.push_back(m_user->pixels());
+        m_user->press(XK_Escape);
+        m_user->waitForBox(false);
+    }
+    EXPECT_TRUE(pictures[0] == pictures[1]) << "It is the same question.";
+    EXPECT_TRUE(m_user->isRunning());
+}
+
+TEST_P(WholeDesktopTest, OpensTwoProjectsInTabsOfWhichEachHasAWorkOfItsOwn)
+{
+    const fs::path other = m_folder / "other.stage";
+    fs::copy_file(m_file, other);
+    m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string(), other.string()});
+    const auto waitForName = [&](const std::string& name) {
+        m_user->waitForTitle("it is " + name,
+                             [&](const std::string& text) { return text.ends_with(name + " - Cadrel"); });
+    };
+    waitForName("other.stage");
+    addCut("Load Old Edl Button", "reel3_v07.edl");
+    m_user->save();
+    m_user->clickTab(0);
+    waitForName("reel3.stage");
+    m_user->waitForRest(20);
+    addCut("Load New Edl Button", "reel3_v12.edl");
+    m_user->save();
+    EXPECT_TRUE(storedModel()->oldEdl().isEmpty());
+    EXPECT_EQ(storedModel()->newEdl().size(), 153U);
+
+    m_user->press('w', XK_Control_L);
+    waitForName("other.stage");
+    EXPECT_TRUE(m_user->isRunning());
+    m_user->press('q', XK_Control_L);
+    EXPECT_EQ(m_user->status(), 0);
+    EXPECT_EQ(storedModel(other)->oldEdl().size(), 152U);
+    EXPECT_TRUE(storedModel(other)->newEdl().isEmpty());
 }
 
 TEST_P(WholeDesktopTest, TakesADroppedEdlIntoTheTableOverWhichItWasLetGo)
@@ -447,12 +555,31 @@ TEST_P(WholeDesktopTest, OffersUnsavedWorkAfterItWasKilled)
     EXPECT_FALSE(fs::exists(kept));
 }
 
+TEST_P(WholeDesktopTest, KeepsUnsavedWorkWhenTheSystemEndsIt)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->waitForTitle("there is unsaved work", [](const std::string& text) { return text.starts_with("*"); });
+    if (GetParam()) {
+        m_user->closeWindow();
+        m_user->waitForBox(true);
+    }
+    m_user->signalProgram(GetParam() ? SIGHUP : SIGTERM);
+    EXPECT_EQ(m_user->status(), -1);
+    EXPECT_TRUE(storedModel()->changeEdl().isEmpty());
+    EXPECT_FALSE(fs::exists(DocumentLock::pathFor(m_file)));
+
+    EXPECT_TRUE(recover());
+    EXPECT_EQ(storedModel()->changeEdl().size(), 60U);
+}
+
 // A few times; the variable CADREL_KILLS says how often else.
 TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyMoment)
 {
     constexpr int Longest = 5000;
     const char* const wanted = std::getenv("CADREL_KILLS");
-    const int count = wanted ? std::atoi(wanted) : 2;
+    const int count = wanted ? std::atoi(wanted) : 4;
     std::mt19937 random(GetParam() ? 2 : 1);
     int offered = 0;
     for (int trial = 0; trial < count; ++trial) {
@@ -467,6 +594,66 @@ TEST_P(WholeDesktopTest, LeavesTheFileAndTheUnsavedWorkWholeWhenItIsKilledAtAnyM
     if (count >= 20) {
         EXPECT_GE(offered, count / 5);
     }
+}
+
+TEST_P(WholeDesktopTest, FitsOnTheScreenWithItsFrame)
+{
+    struct ScreenSize {
+        int width;
+        int height;
+    };
+    for (const auto& [width, height] : {ScreenSize{1366, 768}, {1600, 1000}, {1920, 1080}, {2560, 1440}}) {
+        SCOPED_TRACE(testing::Message() << width << " x " << height);
+        m_user.reset();
+        m_manager.reset();
+        const cadrel::tests::VirtualScreen screen(width, height);
+        if (GetParam())
+            m_manager.emplace();
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, 0, DesktopUser::Size::Own);
+        m_user->waitForRest(20);
+        const DesktopUser::Area frame = m_user->frame();
+        EXPECT_GE(frame.x, 0);
+        EXPECT_GE(frame.y, 0);
+        EXPECT_LE(frame.x + frame.width, width);
+        EXPECT_LE(frame.y + frame.height, height);
+        const DesktopUser::Area module = m_user->moduleArea();
+        EXPECT_LE(module.y + module.height, height);
+        EXPECT_GE(module.height, 450) << "most of it is Cadrel's";
+        m_user.reset();
+        m_manager.reset();
+        fs::remove_all(m_folder / "state");
+    }
+}
+
+TEST_P(WholeDesktopTest, ComesUpAsItWasTheLastTime)
+{
+    const auto quit = [this] {
+        m_user->press('q', XK_Control_L);
+        EXPECT_EQ(m_user->status(), 0);
+    };
+    const auto startAgain = [this] {
+        m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string()}, 0, DesktopUser::Size::Own);
+        m_user->waitForRest(20);
+    };
+    start();
+    m_user->resizeTo(1100, 900);
+    m_user->dragDivider(40);
+    const int top = m_user->moduleArea().y - m_user->area().y;
+    quit();
+    startAgain();
+    EXPECT_EQ(m_user->area().width, 1100);
+    EXPECT_EQ(m_user->area().height, 900);
+    EXPECT_EQ(m_user->moduleArea().y - m_user->area().y, top);
+    if (!GetParam())
+        return;
+    m_user->switchMaximised();
+    EXPECT_EQ(m_user->frame().width, 1400);
+    quit();
+    startAgain();
+    EXPECT_EQ(m_user->frame().width, 1400);
+    m_user->switchMaximised();
+    EXPECT_EQ(m_user->area().width, 1100) << "It is as large as before it was maximised.";
+    EXPECT_EQ(m_user->area().height, 900);
 }
 
 INSTANTIATE_TEST_SUITE_P(WithoutAndWithAWindowManager, WholeDesktopTest, testing::Bool(),

@@ -8,8 +8,10 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <cstdint>
 #include <filesystem>
+#include <memory>
 #include <stdexcept>
 #include <string>
 
@@ -56,6 +58,24 @@ TEST_F(WorkspaceTest, TellsWhyAProjectCannotBeOpened)
     EXPECT_EQ(documents.size(), 0U);
 }
 
+TEST_F(WorkspaceTest, TakesARecentProjectThatIsNotThereOffTheListWhereTheUserWantsThat)
+{
+    RecentFiles recent(folder / "recent.json");
+    const fs::path there = writeProject("there.stage");
+    const fs::path gone = folder / "gone.stage";
+    recent.add(there);
+    recent.add(gone);
+    EXPECT_TRUE(workspace.openRecent(recent, there));
+    EXPECT_EQ(lastMessage(), "");
+
+    boxes.answers = {u"Cancel", u"Take It off the List"};
+    EXPECT_FALSE(workspace.openRecent(recent, gone));
+    EXPECT_NE(lastMessage().find(gone.string()), std::string::npos) << lastMessage();
+    EXPECT_EQ(recent.paths(), (std::vector<fs::path>{gone, there}));
+    EXPECT_FALSE(workspace.openRecent(recent, gone));
+    EXPECT_EQ(recent.paths(), std::vector<fs::path>{there});
+}
+
 TEST_F(WorkspaceTest, OpensEachOfTheProjectsThatAreChosen)
 {
     boxes.choices = {
@@ -99,15 +119,23 @@ TEST_F(WorkspaceTest, StaysOpenWhereTheUserCancels)
     EXPECT_NE(lastMessage().find("reel.stage"), std::string::npos);
 }
 
-TEST_F(WorkspaceTest, StopsClosingAllAtTheFirstThatStaysOpen)
+TEST_F(WorkspaceTest, ClosesNoneOfAllWhereOneIsToStayOpen)
 {
     edited();
     opened("other.stage");
-    boxes.answers = {u"Cancel"};
+    renameTrack(opened("third.stage"), u"Edited");
+    boxes.answers = {u"Close without Saving", u"Cancel"};
     EXPECT_FALSE(workspace.closeAll());
-    EXPECT_EQ(documents.size(), 1U) << "The one without changes was closed.";
-    boxes.answers = {u"Close without Saving"};
+    EXPECT_EQ(documents.size(), 3U);
+    ASSERT_EQ(boxes.messages.size(), 2U);
+    EXPECT_NE(standin::toUtf8(boxes.messages[0]).find("third.stage"), std::string::npos) << "It is in front.";
+    EXPECT_NE(standin::toUtf8(boxes.messages[1]).find("reel.stage"), std::string::npos);
+
+    boxes.answers = {u"Save", u"Close without Saving"};
     EXPECT_TRUE(workspace.closeAll());
+    EXPECT_EQ(documents.size(), 0U);
+    EXPECT_NE(contentOf(folder / "third.stage").find("Edited"), std::string::npos);
+    EXPECT_EQ(contentOf(folder / "reel.stage").find("Edited"), std::string::npos);
 }
 
 TEST_F(WorkspaceTest, NeverOverwritesInSilenceWhatAnotherProgramHasWritten)
@@ -167,6 +195,31 @@ TEST_F(WorkspaceTest, ReloadsAChangedFileWhereTheUserWantsThat)
     workspace.lookAtFile();
     EXPECT_EQ(documents.size(), 1U);
     EXPECT_EQ(documents.active()->project().allTracks().size(), 3U);
+}
+
+TEST_F(WorkspaceTest, KeepsUnsavedWorkAsAFileThatItNamesWhenAChangedFileIsReloaded)
+{
+    edited();
+    folder.write("reel.stage", contentOf(writeProject("foreign.stage", 3)));
+    boxes.answers = {u"Reload"};
+    workspace.lookAtFile();
+    EXPECT_NE(lastMessage().find("is kept in the file \"reel.stage.autosave-1\""), std::string::npos) << lastMessage();
+    EXPECT_EQ(documents.active()->project().allTracks().size(), 3U);
+    EXPECT_NE(contentOf(folder / "reel.stage.autosave-1").find("Edited"), std::string::npos);
+}
+
+TEST_F(WorkspaceTest, AsksBeforeItSavesAsItsOwnFileThatAnotherProgramHasWritten)
+{
+    OpenDocument& document = edited();
+    const std::string foreign = contentOf(writeProject("reel.stage", 3));
+    const std::u16string path = standin::toUtf16(document.path().string());
+    boxes.choices = {{path}, {path}};
+    boxes.answers = {u"Cancel"};
+    EXPECT_FALSE(workspace.saveAs(document));
+    EXPECT_EQ(contentOf(document.path()), foreign);
+    boxes.answers = {u"Overwrite"};
+    EXPECT_TRUE(workspace.saveAs(document));
+    EXPECT_NE(contentOf(document.path()).find("Edited"), std::string::npos);
 }
 
 // Whoever presses a key just when a box comes up.
@@ -344,6 +397,27 @@ TEST_F(WorkspaceTest, TellsOnceThatUnsavedWorkHasNoAutosave)
         EXPECT_EQ(boxes.messages.size(), 1U);
         EXPECT_NE(lastMessage().find("reel.stage.autosave: is in the way"), std::string::npos) << lastMessage();
     }
+}
+
+TEST_F(WorkspaceTest, TellsOnceWhereTheWorkOfAnotherProgramIsThatHasEnded)
+{
+    const fs::path file = fs::canonical(writeProject("reel.stage"));
+    auto lock = std::make_unique<DocumentLock>(file);
+    boxes.answers = {u"Open All the Same"};
+    ASSERT_TRUE(workspace.open(file));
+    Autosave::write(file, ContentPrint::of(contentOf(file)), "its work", std::chrono::system_clock::now());
+    const std::size_t asked = boxes.messages.size();
+    idle();
+    workspace.lookAtAutosaves();
+    EXPECT_EQ(boxes.messages.size(), asked) << "It still works.";
+
+    lock.reset();
+    idle();
+    workspace.lookAtAutosaves();
+    workspace.lookAtAutosaves();
+    EXPECT_EQ(boxes.messages.size(), asked + 1);
+    EXPECT_NE(lastMessage().find("\"reel.stage.autosave-1\""), std::string::npos) << lastMessage();
+    EXPECT_TRUE(fs::exists(folder / "reel.stage.autosave-1"));
 }
 
 TEST_F(WorkspaceTest, SaysThatAFileIsNoVideo)

@@ -110,6 +110,9 @@ TEST_F(ChangeMapTest, KnowsWhereAnEventIsInTheProgrammeOnTheTracks)
     expectSpans({*map(State::Carried).placeOf(1)}, {{25.0, 35.0}});
     expectSpans({*map(State::Planned).placeOf(1)}, {{10.0, 20.0}});
     EXPECT_FALSE(map(State::Carried).placeOf(3));
+    for (const State state : {State::Carried, State::Planned})
+        EXPECT_EQ(map(state).moveOf(1), (ChangeMap::Move{10.0, 25.0}));
+    EXPECT_FALSE(map(State::Carried).moveOf(3));
 }
 
 TEST_F(ChangeMapTest, KnowsWhereAClipStood)

@@ -2,10 +2,18 @@
 
 #include "desktop/tracks/FrameStills.h"
 
+#include "standin/Application.h"
+#include "standin/project/MediaPool.h"
+#include "standin/project/Project.h"
+#include "standin/video/Videos.h"
+#include "tests/support/TempFolder.h"
 #include "tests/support/standin/TestHost.h"
+#include "tests/support/video/TestVideos.h"
 
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <filesystem>
 #include <optional>
 
 using desktop::FrameStills;
@@ -26,6 +34,16 @@ protected:
         return false;
     }
     void makeStills(std::size_t capacity) { m_stills.emplace(m_host.context(), capacity); }
+    /// How often something was to be seen that wasn't before.
+    int pollForAWhile()
+    {
+        int count = 0;
+        for (int milliseconds = 0; milliseconds < 300; ++milliseconds) {
+            count += m_stills->poll() ? 1 : 0;
+            juce::Thread::sleep(1);
+        }
+        return count;
+    }
 
     juce::ScopedJuceInitialiser_GUI m_juce;
     standin::tests::TestHost m_host;
@@ -110,4 +128,49 @@ TEST_F(FrameStillsTest, CanGoWhileAPictureIsDrawn)
     m_stills->still(m_clip, 1, 4000);
     m_stills->poll();
     m_stills.reset();
+}
+
+TEST_F(FrameStillsTest, AskAgainForAPictureOfAFileThatHasComeBack)
+{
+    const cadrel::tests::TempFolder folder;
+    const auto file = folder / "reel.mov";
+    standin::Videos videos;
+    standin::Application host({}, &videos);
+    standin::Project& project = host.createProject();
+    const auto clip = Velmark::makeCounted<MediaClip>(MediaClip::Kind::Video, file.u16string(), 10.0);
+    project.pool().add(clip);
+    m_stills.emplace(host.context(), FrameStills::Capacity, std::chrono::milliseconds(0));
+    m_stills->still(*clip, 1, 40);
+    m_stills->still(*clip, 2, 40);
+    ASSERT_TRUE(waitForOne());
+    ASSERT_TRUE(waitForOne());
+    EXPECT_EQ(m_stills->still(*clip, 1, 40).getWidth(), 160) << "It says why there is no picture.";
+    EXPECT_EQ(pollForAWhile(), 0) << "It says the same again.";
+
+    std::filesystem::create_symlink(
+        standin::tests::videoOf(
+            {.name = "frame_stills.mov", .frames = 240, .rate = "24", .options = "", .width = 320, .height = 192}),
+        file);
+    ASSERT_TRUE(waitForOne());
+    for (const std::uint32_t frame : {1U, 2U}) {
+        if (m_stills->still(*clip, frame, 40).isNull()) {
+            EXPECT_TRUE(waitForOne());
+        }
+        EXPECT_EQ(m_stills->still(*clip, frame, 40).getWidth(), 67) << "It is 320 by 192, and 40 high.";
+    }
+    EXPECT_EQ(m_stills->keptCount(), 2U);
+    EXPECT_EQ(pollForAWhile(), 0) << "A picture isn't asked for again.";
+    m_stills.reset();
+}
+
+TEST_F(FrameStillsTest, DoNotAskAgainForWhatIsNotSeenAnyMore)
+{
+    m_stills.emplace(m_host.context(), FrameStills::Capacity, std::chrono::milliseconds(0));
+    m_stills->still(m_clip, 24, 40); // This host has names of frames alone.
+    ASSERT_TRUE(waitForOne());
+    m_stills->poll();
+    m_stills->startAsking();
+    pollForAWhile();
+    EXPECT_EQ(m_stills->wantedCount(), 0U);
+    EXPECT_FALSE(m_stills->still(m_clip, 24, 40).isNull()) << "It is kept.";
 }

@@ -381,6 +381,21 @@ TEST_F(TracksViewTest, TellsTheEventThatHasMovedTheClipThatIsClicked)
     EXPECT_FALSE(located.empty());
 }
 
+TEST_F(TracksViewTest, MarksAnEventWithoutScrollingWhereThatIsNotWanted)
+{
+    const auto track = m_host.addTrack(TypeWord::Audio, u"DIA 1");
+    m_host.addClip(track, u"moved", 21.0, 27.0);
+    m_view->projectChanged();
+    m_view->fitAll();
+    m_view->setChange(change(ChangeMap::State::Carried));
+    m_view->scrollTo(5000.0);
+    m_view->showEvent(1, false);
+    EXPECT_EQ(m_view->scale().left(), 5000.0);
+    EXPECT_TRUE(m_view->isShown(m_view->index().rows()[0], {21.0, 27.0}));
+    m_view->showEvent(1);
+    EXPECT_LT(m_view->scale().left(), 5000.0);
+}
+
 TEST_F(TracksViewTest, TellsTheEventOfACopyInThePreview)
 {
     const auto track = m_host.addTrack(TypeWord::Audio, u"DIA 1");

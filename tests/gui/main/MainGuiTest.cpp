@@ -23,6 +23,7 @@ using core::DataModel;
 using core::EventListChangeContext;
 using core::ListKind;
 using core::PropertyKey;
+using gui::EventTableModel;
 using gui::LookAndFeel;
 using gui::MainGui;
 using util::Result;
@@ -75,6 +76,33 @@ TEST_F(MainGuiTest, SharesOneLookWithOtherWindows)
     MainGui other;
     EXPECT_EQ(&m_gui->getLookAndFeel(), &other.getLookAndFeel());
     EXPECT_EQ(&m_gui->getLookAndFeel(), &juce::LookAndFeel::getDefaultLookAndFeel());
+}
+
+TEST_F(MainGuiTest, SelectsTheChangeEventThatTheHostNamesByItsPlaces)
+{
+    const core::Timecode source(1, 0, 5, 0);
+    const core::Timecode destination(2, 0, 5, 0);
+    EXPECT_FALSE(m_gui->selectChange(source, destination)) << "There is no model.";
+    showThree();
+    select("Change", {0, 2});
+
+    EXPECT_FALSE(m_gui->selectChange(source, core::Timecode(2, 0, 5, 1)));
+    EXPECT_FALSE(m_gui->selectChange(core::Timecode(1, 0, 4, 23), destination));
+    EXPECT_EQ(tableModel("Change").getNumSelectedRows(), 2);
+
+    EXPECT_TRUE(m_gui->selectChange(source, destination));
+    EXPECT_EQ(tableModel("Change").getSelectedEvents(), EventTableModel::Events{list(ListKind::Change).events()[1]});
+    EXPECT_EQ(property(PropertyKey::ChangeTableSelection), selected("Change")) << "It is stored.";
+    EXPECT_EQ(counters("change"), "3 1 0");
+}
+
+TEST_F(MainGuiTest, SelectsNoChangeEventForTheHostWhileASheetIsOpen)
+{
+    showThree();
+    select("Change", {0});
+    click("Settings Button");
+    EXPECT_FALSE(m_gui->selectChange(core::Timecode(1, 0, 5, 0), core::Timecode(2, 0, 5, 0)));
+    EXPECT_EQ(tableModel("Change").getSelectedEvents(), EventTableModel::Events{list(ListKind::Change).events()[0]});
 }
 
 TEST_F(MainGuiTest, EndsAPreviewThatIsOnWhenItGoes)

@@ -30,10 +30,13 @@ public:
     VideoTrackHandlerBase& getTrackHandler() override { throw std::logic_error("there are no tracks here"); }
 
     std::vector<Request> requests;
+    std::size_t refusedSide = NoSide;
 
 protected:
     void requestImage(std::size_t side, int width, int height, bool lastFrame, double time) override
     {
+        if (side == refusedSide)
+            throw Result::HostCallFailed;
         requests.emplace_back(side, width, height, lastFrame, time);
     }
 };
@@ -71,6 +74,19 @@ TEST(VideoProviderBase, AsksForBothPicturesAtTheStartWhenItIsGivenASize)
     provider.setImageSize(284, 71);
 
     EXPECT_EQ(provider.requests, (Requests{{0, 284, 71, false, 0.0}, {1, 284, 71, false, 0.0}}));
+}
+
+TEST(VideoProviderBase, AsksForTheOtherPictureOfANewSizeAlsoWhenOneIsRefused)
+{
+    RecordingProvider provider;
+    provider.refusedSide = VideoProviderBase::OldSide;
+    EXPECT_EQ(resultOf([&] { provider.setImageSize(284, 71); }), Result::HostCallFailed);
+    EXPECT_EQ(provider.requests, (Requests{{1, 284, 71, false, 0.0}}));
+
+    provider.refusedSide = VideoProviderBase::NewSide;
+    provider.requests.clear();
+    EXPECT_EQ(resultOf([&] { provider.setImageSize(568, 142); }), Result::HostCallFailed);
+    EXPECT_EQ(provider.requests, (Requests{{0, 568, 142, false, 0.0}}));
 }
 
 TEST(VideoProviderBase, HasAnEmptyPictureOfTheSizeUntilOneComes)

@@ -443,6 +443,32 @@ TEST_F(NewVideosDialogTest, AProjectWithOneVideoTrackHasNoSecondOne)
     EXPECT_EQ(ticks(), "x-..");
 }
 
+/// Tells nobody the name of the first.
+class FirstTrackNameless : public TestTracks {
+public:
+    std::wstring getName(std::size_t channel) override
+    {
+        if (channel == 0)
+            throw Result::HostCallFailed;
+        return TestTracks::getName(channel);
+    }
+};
+
+TEST_F(NewVideosDialogTest, ShowsATrackAlsoWhenTheOneBeforeCannotBeRead)
+{
+    FirstTrackNameless tracks;
+    open();
+    m_dialog->setTrackHandler(nullptr);
+    EXPECT_NO_THROW(m_dialog->setTrackHandler(&tracks));
+    EXPECT_EQ(trackNames(), (Texts{"Video Track Name", "No track available.", "VIDEO new"}));
+    EXPECT_EQ(ticks(), "..-x");
+
+    tracks.tracks[1].mode = Mode::Old;
+    tracks.tell();
+    EXPECT_EQ(ticks(), "..x-");
+    m_dialog->setTrackHandler(nullptr);
+}
+
 TEST_F(NewVideosDialogTest, HasNoTracksWithoutAHandler)
 {
     open();

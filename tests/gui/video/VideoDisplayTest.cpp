@@ -3,7 +3,6 @@
 #include "gui/video/VideoDisplay.h"
 
 #include "gui/look/LookAndFeel.h"
-#include "tests/support/ThrownResult.h"
 #include "tests/support/core/TestProject.h"
 #include "tests/support/window/CutTexts.h"
 #include "tests/support/window/FocusedWindow.h"
@@ -255,6 +254,29 @@ TEST_F(VideoDisplayTest, AsksForThePixelsOfTheScreen)
     EXPECT_EQ(m_video->request(Old).height, 154);
 }
 
+TEST_F(VideoDisplayTest, AsksForThePixelsAnewWhenAWindowAroundItIsEnlargedAsAWhole)
+{
+    m_display->setProvider(m_video);
+    juce::Component window;
+    window.addAndMakeVisible(*m_display);
+    window.setSize(300, 272);
+    const auto enlarge = [&](float scale) {
+        window.setTransform(juce::AffineTransform::scale(scale));
+        // The screen does so then.
+        window.createComponentSnapshot(window.getLocalBounds());
+    };
+
+    enlarge(0.5F);
+    EXPECT_EQ(m_video->request(Old).width, 142);
+    EXPECT_EQ(m_video->request(New).height, 19);
+    enlarge(1.0F);
+    EXPECT_EQ(m_video->request(Old).width, 284);
+    EXPECT_EQ(m_video->request(New).height, 38);
+    const int before = m_video->requestCount;
+    enlarge(1.0F);
+    EXPECT_EQ(m_video->requestCount, before);
+}
+
 TEST_F(VideoDisplayTest, AsksForThePixelsOfAScreenThatEnlargesAllWindows)
 {
     juce::Desktop::getInstance().setGlobalScaleFactor(1.5F);
@@ -321,7 +343,8 @@ protected:
 TEST_F(VideoDisplayTest, AsksForTheNewPictureAlsoWhenTheOldOneIsRefused)
 {
     const auto video = std::make_shared<NewVideoAlone>();
-    thrownBy([&] { m_display->setProvider(video); });
+    m_display->setProvider(video);
+    EXPECT_EQ(video->request(New).width, 284);
     showFrames("01:00:10:00", "01:00:08:12", false);
 
     EXPECT_EQ(video->request(New).time, 3608.48);

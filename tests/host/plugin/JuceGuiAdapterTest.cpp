@@ -736,6 +736,17 @@ TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerWhereTheHostGivesNoMorePixels)
     EXPECT_EQ(m_view->getLocalArea(m_content, m_content->getLocalBounds()), juce::Rectangle<int>(0, 0, 650, 375));
 }
 
+TEST_F(JuceGuiAdapterTest, PaintsWhatTheContentLeavesFree)
+{
+    startServer();
+    makeView();
+    m_content->setVisible(false);
+    const juce::Image image = m_view->createComponentSnapshot(m_view->getLocalBounds());
+
+    EXPECT_EQ(image.getPixelAt(0, 0), juce::Colour(0xff070c10));
+    EXPECT_EQ(image.getPixelAt(1299, 749), juce::Colour(0xff070c10));
+}
+
 TEST_F(JuceGuiAdapterTest, ShowsTheContentSmallerOnAFineScreenWithoutAFrame)
 {
     startServer(3200, 2000, 192);

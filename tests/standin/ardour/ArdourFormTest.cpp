@@ -456,6 +456,44 @@ TEST(ArdourForm, WritesARegionThatHasMoved)
     EXPECT_STREQ(written.one("/Session").attribute("id-counter").value(), "2000");
 }
 
+TEST(ArdourForm, ChangesNothingButThePlaceOfARegionThatHasMoved)
+{
+    const auto textAt = [](const std::string& place) {
+        return SessionText{.regions =
+                               "<Region id = '51'\n  note=\"length='a7@a7' &lt;\" start=\"a5880\" length=" + place +
+                               " type=\"audio\"\tsource-0=\"11\" sync-position=\"a0\" whole-file=\"1\"><!-- kept "
+                               "--><FadeIn/>\n</Region>"};
+    };
+    const std::string second = "282240000";
+    const SessionProject session(textAt("'a" + second + "@a" + second + "'"));
+    eventAt(session.track("Dia"), 0).setSpan(5.0, 6.0);
+    EXPECT_EQ(session.text(), std::string(textAt("'a" + second + "@a1411200000'")));
+}
+
+TEST(ArdourForm, ChangesNothingButThePlaceOfARegionOfVersion6000)
+{
+    const auto textAt = [](const std::string& place) {
+        return SessionText{.version = "6000",
+                           .regions = R"(<Region id="51" start="7" length="48000" type="audio" source-0="11" )" +
+                                      place + R"(/>)",
+                           .tempos = ""};
+    };
+    const SessionProject session(textAt(R"(position="48000" positional-lock-style="MusicTime")"));
+    eventAt(session.track("Dia"), 0).setSpan(5.0, 6.0);
+    EXPECT_EQ(session.text(), std::string(textAt(R"(position="240000" positional-lock-style="AudioTime")")));
+}
+
+TEST(ArdourForm, WritesARegionThatStoodAtBeatsInSamplesOnceItHasMoved)
+{
+    const SessionProject session(SessionText{
+        .regions = R"(<Region name="r" start="b960" length="b1920@b3840" id="51" type="audio" source-0="11"/>)"});
+    eventAt(session.track("Dia"), 0).setSpan(5.0, 5.5);
+    const Parsed written(session.text());
+    const pugi::xml_node moved = written.one("//Playlist/Region");
+    EXPECT_STREQ(moved.attribute("length").value(), "a141120000@a1411200000");
+    EXPECT_STREQ(moved.attribute("start").value(), "a70560000");
+}
+
 TEST(ArdourForm, GivesOnlyTheFurtherPiecesOfARegionNewIds)
 {
     const SessionProject session(SessionText{.regions = region(51, 0, 96000)});
@@ -815,6 +853,42 @@ TEST_F(OwnContent, FollowsWhatTheUserHasDoneToItInArdour)
     const SessionProject again(text);
     EXPECT_EQ(again.track("Insert").firstChild()->name(), u"other");
     EXPECT_EQ(again.track("Insert").firstChild()->start(), 0.0);
+}
+
+TEST_F(OwnContent, IsKnownByItsKindOrByItsPlace)
+{
+    const std::string text = session.text();
+    // Name, start and end of the location; where it counts.
+    struct Case {
+        std::string location;
+        const char* track;
+    };
+    for (const Case& each : {Case{R"(name="mine" start="a282240000" end="a564480000")", "Insert"},
+                             Case{R"(name="INSERT 7" start="a0" end="a564480000")", "Insert"},
+                             Case{R"(name="mine" start="a282234120" end="a564480000")", "Markers"},
+                             Case{R"(name="mine" start="a282240000" end="a564485880")", "Markers"},
+                             Case{R"(name="Inser" start="a0" end="a564480000")", "Markers"}}) {
+        const std::string written = R"(name="Insert: new shot" start="a282240000" end="a564480000")";
+        std::string edited = text;
+        const std::size_t at = edited.find(written);
+        ASSERT_NE(at, std::string::npos);
+        edited.replace(at, written.size(), each.location);
+        const SessionProject again(edited);
+        const bool isOwn = std::string(each.track) == "Insert";
+        EXPECT_EQ(again.track("Insert").childCount(), isOwn ? 1U : 0U) << each.location;
+        EXPECT_EQ(again.track("Markers").childCount(), isOwn ? 1U : 2U) << each.location;
+    }
+}
+
+TEST_F(OwnContent, LeavesAMarkOfTheUserAloneThatTheListOfItsMarkersNames)
+{
+    std::string text = session.text();
+    const std::size_t list = text.find("markers=\"") + 9;
+    text.replace(list, text.find('"', list) - list, "64");
+    const SessionProject again(text);
+    EXPECT_EQ(again.track("Insert").childCount(), 0U);
+    // Its own counts as the user's, too, since nothing names it any more.
+    EXPECT_EQ(again.track("Markers").childCount(), 2U);
 }
 
 TEST_F(OwnContent, IsGoneWhenTheUserHasRemovedItInArdour)

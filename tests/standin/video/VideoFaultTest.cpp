@@ -5,6 +5,7 @@
 #include "standin/video/PictureReader.h"
 #include "standin/video/VideoError.h"
 #include "standin/video/VideoFile.h"
+#include "tests/support/NoPrivileges.h"
 #include "tests/support/TempFolder.h"
 #include "tests/support/video/TestVideos.h"
 
@@ -16,6 +17,7 @@
 #include <filesystem>
 #include <functional>
 #include <optional>
+#include <set>
 #include <string>
 
 #include <sys/stat.h>
@@ -86,13 +88,41 @@ TEST(VideoFault, ThePictureOfAnAlbumIsNoFilm)
     EXPECT_EQ(reasonToOpen(album), Reason::NoPicture);
 }
 
-TEST(VideoFault, WhatIsNoVideoIsBroken)
+TEST(VideoFault, WhatIsNoVideoCantBeRead)
 {
     const TempFolder folder;
 
-    EXPECT_EQ(reasonToOpen(folder.write("empty.mov", "")), Reason::Broken);
-    EXPECT_EQ(reasonToOpen(folder.write("text.mov", "This is a text, not a film.\n")), Reason::Broken);
-    EXPECT_EQ(reasonToOpen(folder.path()), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.write("empty.mov", "")), Reason::Unreadable);
+    EXPECT_EQ(reasonToOpen(folder.write("text.mov", "This is a text, not a film.\n")), Reason::Unreadable);
+}
+
+TEST(VideoFault, WhatIsNoFileIsNotOpened)
+{
+    const TempFolder folder;
+
+    EXPECT_EQ(reasonToOpen(folder.path()), Reason::NotOpened);
+    EXPECT_EQ(reasonToOpen("/dev/zero"), Reason::NotOpened);
+}
+
+TEST(VideoFault, AFileThatNobodyMayReadIsNotOpened)
+{
+    const TempFolder folder;
+    const fs::path file = folder.write("film.mp4", contentOf(videoOf(Film)));
+    fs::permissions(folder.path(), fs::perms::all);
+    fs::permissions(file, fs::perms::none);
+    const cadrel::tests::NoPrivileges nobody;
+
+    EXPECT_EQ(reasonToOpen(file), Reason::NotOpened);
+}
+
+TEST(VideoFault, PicturesOfAKindThatNobodyKnowsAreToldFromBrokenOnes)
+{
+    const TempFolder folder;
+    std::string bytes = contentOf(videoOf(Film));
+    const std::size_t kind = bytes.find("avc1", bytes.find("stsd"));
+    ASSERT_NE(kind, std::string::npos);
+
+    EXPECT_EQ(reasonToOpen(folder.write("film.mp4", bytes.replace(kind, 4, "none"))), Reason::UnknownKind);
 }
 
 TEST(VideoFault, APipeIsNotWaitedFor)
@@ -101,18 +131,39 @@ TEST(VideoFault, APipeIsNotWaitedFor)
     const fs::path pipe = folder / "pipe.mov";
     ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
 
-    EXPECT_EQ(reasonToOpen(pipe), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(pipe), Reason::NotOpened);
 }
 
-TEST(VideoFault, NothingButFilesOfThisMachineIsOpened)
+TEST(VideoFault, NoOtherFileIsOpenedThanTheOneThatIsNamed)
 {
     const TempFolder folder;
-    // A play list of another machine's files, in a file that is here.
-    const fs::path list = folder.write("list.m3u8", "#EXTM3U\n#EXT-X-TARGETDURATION:4\n#EXTINF:4,\n"
-                                                    "http://127.0.0.1:9/film.ts\n#EXT-X-ENDLIST\n");
+    fs::copy_file(videoOf({"film.ts", 50, "25", H264}), folder / "film.ts");
+    ASSERT_EQ(mkfifo((folder / "pipe.ts").c_str(), 0600), 0);
+    ASSERT_EQ(reasonToOpen(folder / "film.ts"), std::nullopt);
 
-    EXPECT_NE(reasonToOpen(list), std::nullopt);
+    // One of another machine, one that would be waited for, and one that is good.
+    for (const std::string& other : {std::string("http://127.0.0.1:9/film.ts"), (folder / "pipe.ts").string(),
+                                     std::string("pipe.ts"), std::string("film.ts")}) {
+        const std::string list = "#EXTM3U\n#EXT-X-TARGETDURATION:4\n#EXTINF:4,\n" + other + "\n#EXT-X-ENDLIST\n";
+        EXPECT_EQ(reasonToOpen(folder.write("list.m3u8", list)), Reason::Unreadable) << other;
+        EXPECT_EQ(reasonToOpen(folder.write("list.mov", list)), Reason::Unreadable) << other;
+        EXPECT_EQ(reasonToOpen(folder.write("joined.mov", "ffconcat version 1.0\nfile '" + other + "'\n")),
+                  Reason::Unreadable)
+            << other;
+    }
     EXPECT_EQ(reasonToOpen("http://127.0.0.1:9/film.mp4"), Reason::Missing);
+}
+
+TEST(VideoFault, TheNameOfAFileSaysNothingAboutOthers)
+{
+    const TempFolder folder;
+    const std::string film = contentOf(videoOf(Film));
+
+    for (const char* const name : {"take%03d.mp4", "http:film.mp4", "two\nlines.mp4", "\xd1\x84\xd0\xb8.mp4",
+                                   "no text \xff.mp4", "none", "film.m3u8", "-film.mp4"})
+        EXPECT_EQ(reasonToOpen(folder.write(name, film)), std::nullopt) << name;
+    const fs::path still = madeFile(folder, "still.png", "-f lavfi -i color=red:s=64x64 -frames:v 1");
+    EXPECT_EQ(reasonToOpen(folder.write("still%03d.png", contentOf(still))), std::nullopt);
 }
 
 TEST(VideoFault, AFileThatLostItsEndHasNoMoreThanIsLeft)
@@ -132,13 +183,13 @@ TEST(VideoFault, AFileThatLostItsEndHasNoMoreThanIsLeft)
     EXPECT_EQ(reasonOf([&] { file.picture(199, {25, 1}, Box, inGoodTime()); }), Reason::PastTheEnd);
 }
 
-TEST(VideoFault, AFileThatLostItsIndexIsBroken)
+TEST(VideoFault, AFileThatLostItsIndexCantBeRead)
 {
     const TempFolder folder;
     // The index of this one stands at its end.
     const std::string whole = contentOf(videoOf({"index-last.mp4", 100, "25", H264}));
 
-    EXPECT_EQ(reasonToOpen(folder.write("half.mp4", whole.substr(0, whole.size() / 2))), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.write("half.mp4", whole.substr(0, whole.size() / 2))), Reason::Unreadable);
 }
 
 TEST(VideoFault, TheFramesAroundABrokenPartAreStillShown)
@@ -179,15 +230,18 @@ TEST(VideoFault, TimesThatNoFilmHasAreNone)
         return folder.write("late.mkv", bytes.substr(0, time) + "\xe7\x88" + ticks + bytes.substr(time + 3));
     };
 
-    EXPECT_EQ(reasonToOpen(startingAt("\x7f\xff\xff\xff\xff\xff\xff\xf0")), Reason::Broken);
-    EXPECT_EQ(reasonToOpen(startingAt(std::string("\x10\x00\x00\x00\x00\x00\x10\x00", 8))), Reason::Broken);
-    // This is 2 to the power of 59. The group is longer than it says then, and loses its last picture.
-    VideoFile late(startingAt(std::string("\x08\x00\x00\x00\x00\x00\x00\x00", 8)), inGoodTime());
-    EXPECT_EQ(late.frameCount({25, 1}), 5U);
-    EXPECT_EQ(reasonOf([&] { late.picture(4, {25, 1}, Box, inGoodTime()); }), std::nullopt);
+    // The last one is 2 to the power of 59, and a time. After the others the pictures are counted. The group is longer than it
+    // says then, and loses its last picture.
+    for (const std::string& ticks :
+         {std::string("\x7f\xff\xff\xff\xff\xff\xff\xf0"), std::string("\x10\x00\x00\x00\x00\x00\x10\x00", 8),
+          std::string("\x08\x00\x00\x00\x00\x00\x00\x00", 8)}) {
+        VideoFile late(startingAt(ticks), inGoodTime());
+        EXPECT_EQ(late.frameCount({25, 1}), 5U);
+        EXPECT_EQ(reasonOf([&] { late.picture(4, {25, 1}, Box, inGoodTime()); }), std::nullopt);
+    }
 }
 
-TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeIsBroken)
+TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeCantBeRead)
 {
     const TempFolder folder;
     std::string bytes = contentOf(videoOf(Film));
@@ -196,7 +250,7 @@ TEST(VideoFault, AFileThatAsksForMoreMemoryThanThereMayBeIsBroken)
     ASSERT_NE(table, std::string::npos);
     bytes.replace(table + 8, 8, std::string("\x00\x00\x00\x00\x1f\xff\xff\x00", 8));
 
-    EXPECT_EQ(reasonToOpen(folder.write("greedy.mp4", bytes)), Reason::Broken);
+    EXPECT_EQ(reasonToOpen(folder.write("greedy.mp4", bytes)), Reason::Unreadable);
 }
 
 TEST(VideoFault, APictureOfTooManyPixelsIsNotRead)
@@ -258,11 +312,16 @@ TEST(VideoFault, WhatWasGivenUpGoesOnAtTheNextRequest)
     EXPECT_TRUE(file.picture(399, {25, 1}, Box, inGoodTime()).pixels == wanted.pixels);
 }
 
-TEST(VideoError, EachReasonHasASentence)
+TEST(VideoError, EachReasonHasASentenceOfItsOwn)
 {
+    std::set<std::string> sentences;
     for (const Reason reason :
-         {Reason::Missing, Reason::NoPicture, Reason::Broken, Reason::TooLarge, Reason::TooSlow, Reason::PastTheEnd})
-        EXPECT_TRUE(std::string(VideoError(reason).what()).ends_with("."));
+         {Reason::Missing, Reason::NotOpened, Reason::Unreadable, Reason::NoPicture, Reason::NoSound,
+          Reason::UnknownKind, Reason::Broken, Reason::TooLarge, Reason::TooSlow, Reason::PastTheEnd}) {
+        const std::string sentence = VideoError(reason).what();
+        EXPECT_TRUE(sentence.ends_with(".")) << sentence;
+        EXPECT_TRUE(sentences.insert(sentence).second) << sentence;
+    }
 }
 
 } // namespace standin::tests

@@ -27,6 +27,8 @@ const std::string H264 = "-c:v libx264 -preset veryfast -pix_fmt yuv420p ";
 const std::string OpenGroups =
     H264 + "-bf 3 -x264-params keyint=48:min-keyint=48:scenecut=0:open-gop=1:b-pyramid=normal ";
 const std::string Mpeg2 = "-c:v mpeg2video -b:v 3M -g 15 -bf 2 ";
+/// Several pictures between two times that the file tells.
+const std::string CalmMpeg2 = "-c:v mpeg2video -qscale:v 24 -g 12 -bf 2 ";
 const std::string ProRes = "-c:v prores_ks -profile:v 0 ";
 const std::string Film = "24000/1001";
 const std::string Television = "30000/1001";
@@ -51,6 +53,9 @@ std::vector<VideoRecipe> recipes()
         all.push_back({label + ".mkv", 300, rate, OpenGroups});
         all.push_back({label + ".mxf", 300, rate, Mpeg2 + timecode});
         all.push_back({label + ".mpg", 300, rate, Mpeg2 + "-f vob "});
+        // With more pictures between two times, ffmpeg writes some of these for the wrong pictures.
+        if (rate != FastTelevision)
+            all.push_back({label + "-calm.mpg", 300, rate, CalmMpeg2, 160, 96});
         all.push_back({label + "-prores.mov", 300, rate, ProRes + timecode});
     }
     return all;
@@ -117,12 +122,44 @@ TEST_P(VideoFileOfEachKind, ShowsEachFrameForwardsAndBackwards)
         ASSERT_EQ(see(file, frame, rate).number, static_cast<int>(frame));
 }
 
+TEST_P(VideoFileOfEachKind, ShowsEachFrameBackwardsWhereNothingHasBeenReadYet)
+{
+    VideoFile file(videoOf(GetParam()), inGoodTime());
+    const Ratio rate = exactRate(rateOf(GetParam()));
+
+    for (std::uint32_t frame = 300; frame-- > 0;)
+        EXPECT_EQ(see(file, frame, rate).number, static_cast<int>(frame));
+}
+
 INSTANTIATE_TEST_SUITE_P(Videos, VideoFileOfEachKind, testing::ValuesIn(recipes()), [](const auto& tested) {
     std::string name = tested.param.name;
     for (char& character : name)
         character = std::isalnum(static_cast<unsigned char>(character)) ? character : '_';
     return name;
 });
+
+TEST(VideoFile, OfOnePictureAfterTheLastKeyPictureTheTimeMayBeUntold)
+{
+    // In this container a picture has only the time at which it is decoded, and a key picture stands at each twelfth.
+    for (const int frames : {1, 2, 12, 13, 14, 25}) {
+        for (const char* const codec : {"-c:v mpeg4 -bf 2 -g 12 ", "-c:v libx264 -bf 2 -g 12 "}) {
+            VideoFile file(videoOf({"short.avi", frames, "25", codec}), inGoodTime());
+
+            ASSERT_EQ(file.frameCount({25, 1}), static_cast<std::uint32_t>(frames)) << codec;
+            for (int frame = frames; frame-- > 0;)
+                EXPECT_EQ(see(file, static_cast<std::uint32_t>(frame), {25, 1}).number, frame) << codec << frames;
+        }
+    }
+}
+
+TEST(VideoFile, AFilmWithoutTimesShowsOnePictureAfterTheOther)
+{
+    VideoFile file(videoOf({"bare.h264", 100, "25", H264 + "-bf 2 -g 24 "}), inGoodTime());
+
+    ASSERT_EQ(file.frameCount({25, 1}), 100U);
+    for (const std::uint32_t frame : {0U, 1U, 50U, 99U, 98U, 3U})
+        EXPECT_EQ(see(file, frame, {25, 1}).number, static_cast<int>(frame));
+}
 
 TEST(VideoFile, AFrameIsTheSamePictureHoweverItIsReached)
 {

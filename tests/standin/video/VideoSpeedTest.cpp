@@ -12,6 +12,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
+#include <numeric>
 #include <string>
 #include <vector>
 
@@ -71,6 +72,7 @@ double millisecondsToDecode(const VideoRecipe& recipe)
 
 struct Times {
     double middle;
+    double average;
     double most;
     std::ptrdiff_t slow; ///< how many take over 50 ms
 };
@@ -80,9 +82,10 @@ Times timesOf(const std::string& what, std::vector<double> values)
 {
     std::sort(values.begin(), values.end());
     const auto slow = std::count_if(values.begin(), values.end(), [](double value) { return value >= 50.0; });
-    const Times times{values[values.size() / 2], values.back(), slow};
-    std::printf("%s: %zu frames, half of them under %.1f ms, all under %.1f ms, %td over 50 ms\n", what.c_str(),
-                values.size(), times.middle, times.most, times.slow);
+    const double sum = std::accumulate(values.begin(), values.end(), 0.0);
+    const Times times{values[values.size() / 2], sum / static_cast<double>(values.size()), values.back(), slow};
+    std::printf("%s: %zu frames, half of them under %.1f ms, %.1f ms on average, all under %.1f ms, %td over 50 ms\n",
+                what.c_str(), values.size(), times.middle, times.average, times.most, times.slow);
     return times;
 }
 
@@ -107,7 +110,7 @@ TEST_P(VideoSpeedOfEachKind, TheNextFrameComesAtOnce)
         forward.push_back(millisecondsFor(file, frame));
 
     const Times times = timesOf("forward", forward);
-    EXPECT_LT(times.middle, 50.0);
+    EXPECT_LT(times.average, 50.0);
     EXPECT_LE(times.slow, 2);
 }
 
@@ -122,7 +125,7 @@ TEST_P(VideoSpeedOfEachKind, TheFrameBeforeComesAtOnceThroughAWholeGroup)
 
     // The first steps back have little time to read ahead. Without reading ahead, one of twelve steps decodes the group anew.
     const Times times = timesOf("backward", backward);
-    EXPECT_LT(times.middle, 50.0);
+    EXPECT_LT(times.average, 50.0);
     EXPECT_LE(times.slow, 4);
 }
 
@@ -145,19 +148,21 @@ TEST_P(VideoSpeedOfEachKind, AnyFrameTakesNoMoreThanThePicturesThatOthersNeed)
     EXPECT_LT(timesOf("last frames of a group", any).middle, 0.8 * timesOf("all of a group decoded", group).middle);
 }
 
-TEST(VideoSpeed, AFrameAmidALongGroupTakesUnder300Milliseconds)
+TEST_P(VideoSpeedOfEachKind, AnyFrameTakesUnder300MillisecondsOnAverageWhereTheDecoderIsThatFast)
 {
-    if (CADREL_ADDRESS_SANITIZER)
-        GTEST_SKIP() << "A sanitizer takes its own time.";
-    VideoFile file(videoOf(calm()), inGoodTime());
-    std::vector<double> amid;
+    VideoFile file(videoOf(GetParam()), inGoodTime());
+    std::vector<double> any;
 
-    for (const std::uint32_t from : {253U, 0U, 253U}) {
-        millisecondsFor(file, from);
-        amid.push_back(millisecondsFor(file, 125));
+    // Spread over the group, and each far from the last one.
+    for (std::uint32_t frame = 12; frame < Group; frame += 25) {
+        millisecondsFor(file, 253);
+        any.push_back(millisecondsFor(file, frame));
     }
 
-    EXPECT_LT(timesOf("amid a group", amid).middle, 300.0);
+    // On average half of a group comes before a frame, of which half is left out. With grain, even that takes the decoder longer.
+    constexpr double ShareOfGroup = 0.4;
+    const double most = std::max(300.0, ShareOfGroup * millisecondsToDecode(GetParam()));
+    EXPECT_LT(timesOf("any", any).average, most);
 }
 
 INSTANTIATE_TEST_SUITE_P(Videos, VideoSpeedOfEachKind, testing::Values(calm(), grainy()),

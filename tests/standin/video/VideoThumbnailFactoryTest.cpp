@@ -179,7 +179,7 @@ TEST(VideoThumbnailFactory, TellsWhyThereIsNoPicture)
               0);
     const fs::path film = videoOf(Film);
 
-    host.expectReason(host.addVideo(u"text.mov", 4.0), 0, VideoError::Reason::Broken, {text});
+    host.expectReason(host.addVideo(u"text.mov", 4.0), 0, VideoError::Reason::Unreadable, {text});
     host.expectReason(host.addVideo(u"sound.wav", 4.0), 0, VideoError::Reason::NoPicture, {sound});
     host.expectReason(host.addVideo(film.u16string().c_str(), 5.0), 96, VideoError::Reason::PastTheEnd, {film});
 }
@@ -213,7 +213,7 @@ TEST(VideoThumbnailFactory, DoesNotWaitForWhatComesThroughAPipe)
     const fs::path pipe = host.folder / "pipe.mov";
     ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
 
-    host.expectReason(host.addVideo(u"pipe.mov", 4.0), 0, VideoError::Reason::Broken, {pipe});
+    host.expectReason(host.addVideo(u"pipe.mov", 4.0), 0, VideoError::Reason::NotOpened, {pipe});
 
     EXPECT_EQ(host.numberAt(host.addVideo(videoOf(Film).u16string().c_str(), 4.0), 40), 40);
 }
@@ -242,7 +242,7 @@ TEST(VideoThumbnailFactory, NoticesThatTheOpenFileWasCutShort)
     // The index of this file stands at its end.
     fs::resize_file(file, fs::file_size(file) / 2);
 
-    host.expectReason(clip, 10, VideoError::Reason::Broken, {file});
+    host.expectReason(clip, 10, VideoError::Reason::Unreadable, {file});
 }
 
 TEST(VideoThumbnailFactory, NoticesThatTheOpenFileWasReplaced)

@@ -127,7 +127,7 @@ void FocusedWindow::click(juce::Point<int> place)
 
 void FocusedWindow::pump()
 {
-    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(60);
     // The last message sends others, which come after it.
     for (int round = 0; round < 3; ++round) {
         const auto isDone = std::make_shared<bool>(false);

@@ -86,7 +86,7 @@ void WindowOnScreen::serve()
 
 bool WindowOnScreen::serveUntil(const std::function<bool()>& condition)
 {
-    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(60);
     while (std::chrono::steady_clock::now() < end) {
         serve();
         if (condition())

@@ -17,7 +17,7 @@ void HostLoop::turn(int times)
 
 bool HostLoop::turnUntil(const std::function<bool()>& condition)
 {
-    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(60);
     while (!condition()) {
         if (std::chrono::steady_clock::now() > end)
             return false;

@@ -35,7 +35,7 @@ public:
     {
         tell("XdndEnter", {0, version() << 24, static_cast<long>(atom("text/uri-list")), 0, 0});
         move();
-        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(60);
         while (!m_isTaken) {
             if (std::chrono::steady_clock::now() > end)
                 throw std::runtime_error("the window doesn't take the files");
