@@ -66,7 +66,7 @@ videos:
 	build/release/bin/render_reel3 $(reel3)/reel3_v12.edl $(reel3)/Video/LW_R3_v12.mov
 
 docs-pictures: $(reel3)/Video/LW_R3_v12.mov
-	@cmake/build.sh release cadrel make_cuts cadrel_module_tests cadrel_desktop_tests
+	@cmake/build.sh release cadrel make_cuts cadrel_desktop_tests
 	@cmake/install-packages.sh pictures
 	docs/make-pictures.sh build/release/bin
 

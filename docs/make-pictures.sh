@@ -1,6 +1,6 @@
 #!/bin/sh
 # make-pictures.sh PROGRAMS: takes the notes of the example, of a real reel and of a film of 20 reels with the programs of a build,
-# and lets tests on the example reel take the window. Writes the pictures of them to docs/pictures.
+# and lets a test on the example reel take the window. Writes the pictures of them to docs/pictures.
 set -eu
 cd "$(dirname "$0")/.."
 programs=$1
@@ -44,15 +44,11 @@ sed -e 's/<details class="sound">/<details class="sound" open>/' \
     -e 's/<\/style>/main > :not(#r1, #r1 ~ *) { display: none; } #r1 { margin-top: 0; }<\/style>/' \
     "$work/folded.html" >"$work/sound.html"
 page sound 1000 light:1
-# The window, as the module shows it in the host of the tests.
-"$programs/cadrel_module_tests" --gtest_filter='ExampleReelTest.*' >"$work/window.log"
-for name in add menu preview settings videos; do
-    cp "$programs/../window/window-$name.png" "$work/"
-done
-# The program with the window.
+# The program with the window, in which the example is conformed.
 "$programs/cadrel_desktop_tests" --gtest_filter='*ConformsAReel*WithoutAWindowManager' >"$work/desktop.log"
-for name in open generated question conformed; do
-    cp "$programs/../window/desktop-$name.png" "$work/"
+for name in desktop-open desktop-generated desktop-question desktop-conformed \
+    window-add window-menu window-preview window-settings window-videos; do
+    cp "$programs/../window/$name.png" "$work/"
 done
 for picture in "$work"/notes-*.png "$work"/window-*.png "$work"/desktop-*.png; do
     pngquant --force --strip --output "$pictures/$(basename "$picture")" 192 "$picture"

@@ -16,7 +16,7 @@ namespace {
 
 using core::ListKind;
 
-/// The example reel, whose README says what changed. The pictures of this are those of the manual.
+/// The example reel, whose README says what changed.
 class ExampleReelTest : public LoadedWindow {
 protected:
     void addCut(const std::string& button, const char* file)

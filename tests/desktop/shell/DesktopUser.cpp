@@ -187,10 +187,15 @@ DesktopUser::Pixel DesktopUser::middleOf(const WindowPlaces::Place& place) const
     return {origin.x + place.x + place.width / 2, origin.y + place.y + place.height / 2};
 }
 
-void DesktopUser::clickAt(const WindowPlaces::Place& place)
+void DesktopUser::moveTo(const WindowPlaces::Place& place)
 {
     const Pixel middle = middleOf(place);
     m_user.moveTo(middle.x, middle.y);
+}
+
+void DesktopUser::clickAt(const WindowPlaces::Place& place)
+{
+    moveTo(place);
     m_user.click();
 }
 
@@ -252,10 +257,15 @@ void DesktopUser::clickTab(int tab)
     m_user.click();
 }
 
-void DesktopUser::clickChangeEvent(int row)
+WindowPlaces::Place DesktopUser::changeEventPlace(int row) const
 {
     const WindowPlaces::Place first = m_places.at(Main, "Change Table List Box Row");
-    clickAt(first.movedBy(0, row * first.height));
+    return first.movedBy(0, row * first.height);
+}
+
+void DesktopUser::clickChangeEvent(int row)
+{
+    clickAt(changeEventPlace(row));
 }
 
 void DesktopUser::clickSecondVideo(const char* column)
@@ -404,12 +414,41 @@ void DesktopUser::waitForRest(int turns)
 
 void DesktopUser::picture(const std::string& name)
 {
+    writePicture(m_window, name);
+}
+
+void DesktopUser::modulePicture(const std::string& name)
+{
+    writePicture(m_container, name);
+}
+
+void DesktopUser::menuPicture(int row, const std::string& name)
+{
+    const int windows = m_windows.windowCount();
+    moveTo(changeEventPlace(row));
+    m_user.rightClick();
+    waitFor("the menu is open", [&] { return m_windows.windowCount() > windows; });
+    // A menu takes no key before it is open.
+    waitForRest(10);
+    press(XK_Down);
+    waitForRest(10);
+    press(XK_Right);
+    waitFor("the menu within it is open", [&] { return m_windows.windowCount() > windows + 1; });
+    modulePicture(name);
+    press(XK_Escape);
+    waitForRest(10);
+    press(XK_Escape);
+    waitFor("the menus are closed", [&] { return m_windows.windowCount() == windows; });
+}
+
+void DesktopUser::writePicture(unsigned long window, const std::string& name)
+{
     // Longer than from a change to its being drawn.
     waitForRest(40);
     const std::filesystem::path folder =
         std::filesystem::path(cadrel::tests::programPath("../window")).lexically_normal();
     std::filesystem::create_directories(folder);
-    m_windows.writePicture(m_window, folder / (name + ".png"));
+    m_windows.writePicture(window, folder / (name + ".png"));
 }
 
 std::string DesktopUser::title() const

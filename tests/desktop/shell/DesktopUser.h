@@ -32,6 +32,7 @@ public:
 
     static constexpr const char* Main = "";
     static constexpr const char* Files = "m_fileDialog";
+    static constexpr const char* Settings = "m_settingsDialog";
     static constexpr const char* Videos = "m_videosDialog";
 
     /// Starts the program on the screen of the environment, with its state in the folder `home`, and waits for its window and
@@ -89,6 +90,10 @@ public:
 
     /// Writes what the window shows to the folder `window` of the build, when it has come to rest. Without a window manager.
     void picture(const std::string& name);
+    /// The same of Cadrel's window alone.
+    void modulePicture(const std::string& name);
+    /// The same of the menu of an event of the change list, counted from 0, with the part for healing open.
+    void menuPicture(int row, const std::string& name);
 
     /// Waits until Cadrel's window shows both stills with these numbers in their bars.
     void waitForStills(int oldNumber, int newNumber);
@@ -126,7 +131,10 @@ private:
     Area areaOf(unsigned long window) const;
     void sendToManager(const char* message, long first, long second, long third);
     Pixel middleOf(const cadrel::tests::WindowPlaces::Place& place) const;
+    void moveTo(const cadrel::tests::WindowPlaces::Place& place);
     void clickAt(const cadrel::tests::WindowPlaces::Place& place);
+    cadrel::tests::WindowPlaces::Place changeEventPlace(int row) const;
+    void writePicture(unsigned long window, const std::string& name);
 
     _XDisplay* m_display;
     pid_t m_process;
