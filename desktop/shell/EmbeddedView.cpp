@@ -152,9 +152,20 @@ void EmbeddedView::setCovered(bool isCovered)
     repaint();
 }
 
+bool EmbeddedView::hasKeyboard() const
+{
+    return m_window && m_window->container().hasKeyboard();
+}
+
+void EmbeddedView::takeKeyboard()
+{
+    if (m_window && m_window->isShown() && !m_isCovered)
+        m_window->listener().focusChanged(true);
+}
+
 void EmbeddedView::giveKeyboardAway()
 {
-    if (m_window && m_window->container().hasKeyboard())
+    if (hasKeyboard())
         m_window->container().giveKeyboardAway();
 }
 
