@@ -217,7 +217,10 @@ void DesktopProgram::takeDropped(const std::vector<fs::path>& files, juce::Point
 void DesktopProgram::passLists(const std::vector<std::string>& files, juce::Point<int> place)
 {
     EmbeddedView& embedded = m_window.view().embedded();
-    if (!embedded.drop(files, embedded.getLocalPoint(&m_window.view(), place)))
+    if (!m_documents.active())
+        m_workspace.tell(
+            "Open the project first, or drop it here. Then drop EDLs on the Old EDL, New EDL or Change EDL table.");
+    else if (!embedded.drop(files, embedded.getLocalPoint(&m_window.view(), place)))
         m_workspace.tell("Drop EDLs on the Old EDL, New EDL or Change EDL table.");
 }
 

@@ -14,6 +14,7 @@ namespace desktop {
 namespace {
 
 constexpr int HintFont = 0;
+constexpr std::chrono::milliseconds PaintTime(300);
 
 juce::Image imageOf(const XContainer::Picture& picture)
 {
@@ -140,11 +141,11 @@ void EmbeddedView::setCovered(bool isCovered)
     XContainer& container = m_window->container();
     if (isCovered) {
         m_hadKeyboard = container.hasKeyboard();
-        const auto picture = container.picture();
-        m_picture = picture ? imageOf(*picture) : juce::Image();
+        m_picture = takePicture();
         container.hide();
     } else {
-        m_picture = {};
+        m_formerPicture = std::exchange(m_picture, {});
+        m_uncovered = std::chrono::steady_clock::now();
         container.show();
         if (m_hadKeyboard)
             m_window->listener().focusChanged(true);
@@ -161,6 +162,15 @@ void EmbeddedView::takeKeyboard()
 {
     if (m_window && m_window->isShown() && !m_isCovered)
         m_window->listener().focusChanged(true);
+}
+
+juce::Image EmbeddedView::takePicture()
+{
+    const auto picture = m_window->container().picture();
+    juce::Image image = picture ? imageOf(*picture) : juce::Image();
+    // Where one box comes right after another, the module's window hasn't been painted yet, and shows what was in its place.
+    const bool isPainted = std::chrono::steady_clock::now() - m_uncovered > PaintTime;
+    return !isPainted && image.getBounds() == m_formerPicture.getBounds() ? m_formerPicture : image;
 }
 
 void EmbeddedView::giveKeyboardAway()

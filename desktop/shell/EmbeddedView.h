@@ -7,6 +7,7 @@
 
 #include <juce_gui_basics/juce_gui_basics.h>
 
+#include <chrono>
 #include <string>
 #include <vector>
 
@@ -57,7 +58,12 @@ private:
 
     juce::String m_hint;
     Window* m_window = nullptr; ///< not owned
+    /// Of the window, or null.
+    juce::Image takePicture();
+
     juce::Image m_picture;
+    juce::Image m_formerPicture; ///< of the last time that it was covered
+    std::chrono::steady_clock::time_point m_uncovered;
     bool m_isCovered = false;
     bool m_hadKeyboard = false;
 };

@@ -101,6 +101,7 @@ public:
     /// stays as it is. While one, or the end of a preview, is being carried out, the answer is Result::NotAvailable.
     util::Result::Type startCadrel() override;
     util::Result::Type startCadrelWithin(const core::SecondsRange& bounds) override;
+    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds, const core::EventList& changeList) override;
     std::vector<core::SecondsRange> getMaterial() override;
     util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                     std::uint32_t options) override;
@@ -231,7 +232,7 @@ private:
     void requireIdle() const;
     /// Makes sure that there is a preview offset, and throws what keeps a run from beginning.
     void prepareStart();
-    util::Result::Type requestRun(const std::optional<core::SecondsRange>& bounds);
+    util::Result::Type requestRun(const std::optional<core::SecondsRange>& bounds, const core::EventList* changeList);
     /// The one that is open.
     Velmark::IEditTransaction& openTransaction() const;
     void announce(const wchar_t* text);
@@ -250,6 +251,7 @@ private:
     bool m_processing = false;                     ///< from the begin of a transaction to the end of its commit
     bool m_runRequested = false;
     std::optional<core::SecondsRange> m_runBounds;     ///< of the run that was requested, where it has some
+    std::optional<core::EventList> m_runList;          ///< likewise
     std::optional<core::RestrictedRange> m_restricted; ///< while a run with bounds goes on
     bool m_previewRequested = false;
     std::optional<std::int32_t> m_served; ///< the action of the request that is being carried out

@@ -119,15 +119,20 @@ void Host::tellDropped(const std::vector<std::int32_t>& actions)
 
 Result::Type Host::startCadrel()
 {
-    return requestRun(std::nullopt);
+    return requestRun(std::nullopt, nullptr);
 }
 
 Result::Type Host::startCadrelWithin(const core::SecondsRange& bounds)
 {
-    return requestRun(bounds);
+    return requestRun(bounds, nullptr);
 }
 
-Result::Type Host::requestRun(const std::optional<core::SecondsRange>& bounds)
+Result::Type Host::startCadrelWithin(const core::SecondsRange& bounds, const core::EventList& changeList)
+{
+    return requestRun(bounds, &changeList);
+}
+
+Result::Type Host::requestRun(const std::optional<core::SecondsRange>& bounds, const core::EventList* changeList)
 {
     return resultOf([&] {
         requireIdle();
@@ -135,6 +140,9 @@ Result::Type Host::requestRun(const std::optional<core::SecondsRange>& bounds)
         requireSoundBounds(m_currentProject->model().settings());
         m_runRequested = true;
         m_runBounds = bounds;
+        m_runList.reset();
+        if (changeList)
+            m_runList.emplace(*changeList);
     });
 }
 
@@ -193,9 +201,12 @@ Result::Type Host::runCadrel()
     if (!held)
         return Result::NoProject;
     Project& project = *held;
-    const core::EventList& changeList = project.model().changeEdl();
+    core::EventList& changeList = project.model().changeEdl();
+    // Once the run has begun, its list is that of the model.
+    const std::optional<core::EventList> ownList = std::exchange(m_runList, std::nullopt);
+    const std::size_t eventCount = ownList ? ownList->size() : changeList.size();
     VideoWriting video = VideoWriting::Done;
-    const Result::Type result = withProgress(project, {L"Processing Project", true}, changeList.size(), [&] {
+    const Result::Type result = withProgress(project, {L"Processing Project", true}, eventCount, [&] {
         // What the user lets change; the bounds leave out what stays as it is.
         const core::FrameRange allowed = core::RunRecord::allowedBy(project.model().settings());
         if (m_runBounds)
@@ -205,6 +216,8 @@ Result::Type Host::runCadrel()
         requireSuccess(edit(project, name, [&](IEditTransaction& transaction) {
             core::EditTransactionHandle handle(transaction);
             const auto command = createCommand(handle);
+            if (ownList)
+                changeList = *ownList;
             requireSuccess(removeVirginTerritoryMarkers());
             project.createMarkerTracks(transaction);
             const SessionEnd sessionEnd(project);

@@ -24,7 +24,8 @@ public:
     static constexpr InterfaceId<IAlertService> iid{"37bdb6a165fb4994988604549461a2bb"};
 
     /// Waits for the user and answers which button was used, counted from 1. A null label leaves the button out; without
-    /// any there is the host's default button. UTF-16.
+    /// any there is the host's default button. Return uses button1, and Escape the last button; where button1 is left out and
+    /// another isn't, Return uses the last one, too. UTF-16.
     virtual int32 show(const char16_t* message, const char16_t* button1, const char16_t* button2,
                        const char16_t* button3) = 0;
 };

@@ -305,13 +305,17 @@ void ArdourReader::readSources(Project& project)
     // How much of a source the regions know.
     std::map<SessionId, double> lengths;
     const auto measure = [&](const pugi::xml_node& region) {
-        const std::optional<SessionId> source = idIn(region.attribute("source-0").value());
-        if (!source || std::strcmp(region.attribute("type").value(), "audio") != 0)
+        // In the order in which Ardour writes them, each is found after the one before.
+        pugi::xml_attribute last;
+        const char* const start = region.attribute("start", last).value();
+        const std::string_view length = region.attribute("length", last).value();
+        const char* const type = region.attribute("type", last).value();
+        const std::optional<SessionId> source = idIn(region.attribute("source-0", last).value());
+        if (!source || std::strcmp(type, "audio") != 0)
             return;
-        const std::string_view length = region.attribute("length").value();
         const SessionClock& clock = m_session.clock;
-        const double end = clock.seconds(region.attribute("start").value()) +
-                           clock.seconds(length.substr(0, clock.hasUnits() ? length.find('@') : length.npos));
+        const double end =
+            clock.seconds(start) + clock.seconds(length.substr(0, clock.hasUnits() ? length.find('@') : length.npos));
         double& known = lengths[*source];
         known = std::max(known, end);
     };
@@ -420,21 +424,21 @@ void ArdourReader::readPlaylist(SessionId route, const pugi::xml_node& playlist,
 {
     ArdourSession::Playlist& read = m_session.playlists[route];
     for (const pugi::xml_node& region : playlist.children("Region")) {
-        if (std::strcmp(region.attribute("type").value(), "audio") == 0) {
-            readRegion(region, track);
-            read.regions.push_back(idOf(region));
-        }
+        if (std::strcmp(region.attribute("type").value(), "audio") == 0)
+            read.regions.push_back(readRegion(region, track));
     }
 }
 
-void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
+SessionId ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
 {
+    pugi::xml_attribute last;
+    const std::string name = region.attribute("name", last).value();
+    const std::string_view start = region.attribute("start", last).value();
+    const std::string_view length = region.attribute("length", last).value();
     const SessionId id = idOf(region);
-    const std::string name = region.attribute("name").value();
     const SessionClock& clock = m_session.clock;
     ArdourSession::Region read;
     read.text = rangeOf(region);
-    const std::string_view length = region.attribute("length").value();
     if (clock.hasUnits()) {
         const std::size_t at = length.find('@');
         if (at == length.npos)
@@ -445,7 +449,6 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
         read.position = clock.samples(region.attribute("position").value());
         read.length = clock.samples(length);
     }
-    const std::string_view start = region.attribute("start").value();
     read.start = clock.samples(start);
     read.isMusical = clock.hasUnits() && (SessionClock::isMusical(start) || length.find('b') != length.npos);
     const SessionId source = idIn(region.attribute("source-0").value()).value_or(-1);
@@ -485,6 +488,7 @@ void ArdourReader::readRegion(const pugi::xml_node& region, Track& track)
     event->setSourceOffset(clock.secondsOf(read.start) + (head - first));
     event->setSpan(head, tail);
     event->insertInto(track);
+    return id;
 }
 
 double ArdourReader::distanceToFrame(double seconds) const

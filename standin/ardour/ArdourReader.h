@@ -49,7 +49,8 @@ private:
     /// The track that was stored for a route, taken out of the project, or a new one.
     Velmark::Counted<Track> trackOf(SessionId route);
     void readPlaylist(SessionId route, const pugi::xml_node& playlist, Track& track);
-    void readRegion(const pugi::xml_node& region, Track& track);
+    /// Gives its id.
+    SessionId readRegion(const pugi::xml_node& region, Track& track);
     /// How far the frame lies from a time that is near to it, in seconds; 0 for a time that isn't, and where each frame is a
     /// whole number of samples.
     double distanceToFrame(double seconds) const;

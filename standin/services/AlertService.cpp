@@ -2,6 +2,7 @@
 
 #include "standin/services/AlertService.h"
 
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -30,11 +31,15 @@ int32 AlertService::show(const char16_t* message, const char16_t* button1, const
         m_boxes->ask(message, {DefaultLabel});
         return FirstButton;
     }
+    if (labels.empty()) {
+        m_terminal.writeMessage(message);
+        return FirstButton;
+    }
+    const std::size_t byReturn = button1 ? 0 : labels.size() - 1;
     if (m_boxes)
-        return numbers[m_boxes->ask(message, labels)];
-    m_terminal.writeMessage(labels.empty() ? std::u16string(message)
-                                           : std::u16string(message) + u" [" + labels.front() + u"]");
-    return labels.empty() ? FirstButton : numbers.front();
+        return numbers[m_boxes->ask(message, labels, byReturn)];
+    m_terminal.writeMessage(std::u16string(message) + u" [" + labels[byReturn] + u"]");
+    return numbers[byReturn];
 }
 
 } // namespace standin

@@ -9,8 +9,8 @@
 
 namespace standin {
 
-/// Alerts as boxes or, without these, as messages on the terminal. There nobody is asked: the first button is the default and
-/// counts as used, and its label comes after the message.
+/// Alerts as boxes or, without these, as messages on the terminal. There nobody is asked: the button of Return counts as used,
+/// and its label comes after the message.
 class AlertService : public Velmark::Implements<AlertService, Velmark::FObject, Velmark::IAlertService> {
 public:
     static constexpr const char* ClassName = "AlertService";

@@ -43,6 +43,12 @@ std::int64_t sensible(std::int64_t ticks, std::int64_t unless)
     return ticks >= -MostTicks && ticks <= MostTicks ? ticks : unless;
 }
 
+/// Of the picture in the packet, as far as it is known.
+std::int64_t decodeTimeOf(const AVPacket& packet)
+{
+    return packet.pts != NoTime ? packet.pts : packet.dts;
+}
+
 bool isPositive(AVRational ratio)
 {
     return ratio.num > 0 && ratio.den > 0;
@@ -111,12 +117,44 @@ Ratio rateOf(AVFormatContext& format, AVStream& stream)
 
 } // namespace
 
+bool PictureReader::isDamaged(const AVFrame& picture)
+{
+    return (picture.flags & AV_FRAME_FLAG_CORRUPT) != 0 || picture.decode_error_flags != 0;
+}
+
 PictureReader::PictureReader(const fs::path& file, Deadline deadline) : m_file(file), m_deadline(deadline)
 {
     rewind();
 }
 
 bool PictureReader::next(AVFrame& picture)
+{
+    av_frame_unref(&picture);
+    if (m_heldBack) {
+        av_frame_move_ref(&picture, m_heldBack.get());
+        m_heldBack.reset();
+    } else if (!decodeNext(picture)) {
+        return false;
+    } else if (const auto hole = holeBefore(timeOf(picture))) {
+        m_heldBack = owned(av_frame_alloc());
+        av_frame_move_ref(m_heldBack.get(), &picture);
+        picture.best_effort_timestamp = *hole;
+        picture.flags |= AV_FRAME_FLAG_CORRUPT;
+    }
+    if (m_damage.isAt(timeOf(picture)))
+        picture.flags |= AV_FRAME_FLAG_CORRUPT;
+    m_lastTime = timeOf(picture);
+    m_hasBegun = true;
+    return true;
+}
+
+/// Where pictures are missing that should come before that time and couldn't be decoded.
+std::optional<std::int64_t> PictureReader::holeBefore(std::int64_t ticks) const
+{
+    return m_hasBegun ? m_damage.firstBetween(*m_lastTime, ticks) : std::nullopt;
+}
+
+bool PictureReader::decodeNext(AVFrame& picture)
 {
     while (true) {
         if (isLate())
@@ -129,8 +167,10 @@ bool PictureReader::next(AVFrame& picture)
             feed();
             continue;
         }
-        if (error < 0)
-            continue; // The decoder goes on with what comes after the damage.
+        if (error < 0) {
+            noteDamage(decodeTimeOf(*m_packet)); // The decoder goes on with what comes after the damage.
+            continue;
+        }
         if (timeOf(picture) == NoTime) {
             if (!m_lastTime)
                 continue;
@@ -138,7 +178,8 @@ bool PictureReader::next(AVFrame& picture)
         }
         if (m_entry && timeOf(picture) < *m_entry)
             continue;
-        m_lastTime = timeOf(picture);
+        if (isDamaged(picture))
+            noteDamage(timeOf(picture));
         return true;
     }
 }
@@ -151,8 +192,19 @@ void PictureReader::feed()
         return;
     }
     decide(*m_packet);
-    // What can't be decoded is told by the picture that is missing then.
-    avcodec_send_packet(m_decoder.get(), m_packet.get());
+    const std::int64_t time = decodeTimeOf(*m_packet);
+    if (time != NoTime)
+        m_damage.feed(time, (m_packet->flags & AV_PKT_FLAG_KEY) != 0);
+    const bool isCutOff = (m_packet->flags & AV_PKT_FLAG_CORRUPT) != 0;
+    if (avcodec_send_packet(m_decoder.get(), m_packet.get()) < 0 || isCutOff)
+        noteDamage(time);
+}
+
+/// The pictures before the key picture at which it began are left out, and aren't expected to be whole.
+void PictureReader::noteDamage(std::int64_t ticks)
+{
+    if (ticks != NoTime && (!m_entry || ticks >= *m_entry))
+        m_damage.note(ticks);
 }
 
 /// Reads the next packet of the video. False at the end of the file, and where it can't be read any further.
@@ -251,6 +303,9 @@ void PictureReader::restart()
     m_leaveOutBefore.reset();
     m_lastLeftOut.reset();
     m_lastTime.reset();
+    m_heldBack.reset();
+    m_damage = {};
+    m_hasBegun = false;
 }
 
 std::int64_t PictureReader::findEnd()

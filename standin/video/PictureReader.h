@@ -3,6 +3,7 @@
 #pragma once
 
 #include "standin/video/Av.h"
+#include "standin/video/DamagedTimes.h"
 #include "standin/video/FrameClock.h"
 #include "standin/video/VideoError.h"
 
@@ -30,8 +31,11 @@ public:
     /// Whether what comes next isn't known, after a failure; a `rewind` or a `seek` tells it again.
     bool hasLostItsPlace() const { return m_hasLostItsPlace; }
 
-    /// Its time is what `timeOf` says. False at the end of the file.
+    /// Its time is what `timeOf` says. False at the end of the file. Where pictures can't be decoded, one that is damaged and has
+    /// no pixels stands for them.
     bool next(AVFrame& picture);
+    /// Whether parts of it had to be guessed, or may have been made of others that were guessed.
+    static bool isDamaged(const AVFrame& picture);
     /// Sets it to a key picture that was stored at or before that time, as far as the file tells. The pictures that are shown
     /// before that key picture are left out, since they may need others that come before it. False when it can't be done.
     bool seek(std::int64_t ticks);
@@ -59,6 +63,9 @@ public:
 
 private:
     bool isLate() const { return std::chrono::steady_clock::now() >= m_deadline; }
+    bool decodeNext(AVFrame& picture);
+    std::optional<std::int64_t> holeBefore(std::int64_t ticks) const;
+    void noteDamage(std::int64_t ticks);
     /// Gives the decoder what comes next, which may be the end.
     void feed();
     bool readPacket();
@@ -93,6 +100,9 @@ private:
     std::optional<std::int64_t> m_leaveOutBefore;
     std::optional<std::int64_t> m_lastLeftOut;
     std::optional<std::int64_t> m_lastTime; ///< of the picture before
+    AvOwner<AVFrame> m_heldBack;            ///< what comes after a hole; null when none does
+    DamagedTimes m_damage;
+    bool m_hasBegun = false; ///< a picture has come since the last seek
 };
 
 } // namespace standin

@@ -45,12 +45,6 @@ Ratio pixelAspectOf(const AVFrame& picture, const AVStream& stream)
     return aspect.num > 0 && aspect.den > 0 ? Ratio{aspect.num, aspect.den} : Ratio{1, 1};
 }
 
-/// Whether parts of it had to be guessed.
-bool isDamaged(const AVFrame& picture)
-{
-    return (picture.flags & AV_FRAME_FLAG_CORRUPT) != 0 || picture.decode_error_flags != 0;
-}
-
 } // namespace
 
 VideoFile::VideoFile(const std::filesystem::path& file, Deadline deadline) : m_reader(file, deadline)
@@ -82,7 +76,7 @@ Picture VideoFile::picture(std::uint32_t frame, Ratio rate, PictureSize box, Dea
         const bool isKnown = m_run.find(frame, clock) != nullptr;
         const AVFrame& found = pictureAt(frame, clock);
         m_onTheWayTo.reset();
-        if (isDamaged(found))
+        if (PictureReader::isDamaged(found))
             throw VideoError(Reason::Broken);
         Picture drawn = m_drawing.draw(found, pixelAspectOf(found, m_reader.stream()), m_orientation, box);
         if (m_goesBack && isKnown)

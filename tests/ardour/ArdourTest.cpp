@@ -233,9 +233,9 @@ TEST_F(InArdour, EachRegionAndEachValueStandsAndSoundsAsWhereItsPictureWas)
     ASSERT_EQ(before.regions.size(), 200U);
     expectTheSameRegions(after, before, Film);
     expectTheSameValues(after, before, samples);
-    // Each of the tracks may differ a little.
-    expectTheSameMix(session, New, Film, BesideChanges, {100000, 170000, 250000, 340000, 370000, 420000, 440000},
-                     8 * Inaudible);
+    // The last of the gain's changes takes 20,000 samples. Each of the tracks may differ a little.
+    expectTheSameMix(session, New, Film, BesideChanges,
+                     {100000, 170000, 250000, 340000, 370000, 420000, 425000, 430000, 435000, 440000}, 8 * Inaudible);
 }
 
 TEST_F(InArdour, TrimSendsBussesAndVcasFollowThePictureThroughChangesOfTheTempo)
@@ -394,21 +394,6 @@ TEST_F(InArdour, ASecondRunThatTakesTheCutBackLeavesNoFadeWhereThePiecesMeetAgai
     EXPECT_EQ(destinations(once), 2);
     EXPECT_EQ(destinations(twice), 2);
     expectTheSameMix(session, "back", {250, {{0, 250}}}, 0);
-}
-
-TEST_F(InArdour, ARunAfterArdourHasSavedTheSessionCarriesItOver)
-{
-    const ConformedSession session(
-        "again", Swapped, {.tracks = 3, .regionsATrack = 12, .points = "gain:0:1 gain:200000:0.25 mute:90000:1"});
-    session.conform(New);
-    ArdourProgram::resave(session.folder(), New);
-    session.conformAgain(New, Film, "next");
-    const Samples samples(Film);
-    const ArdourDump before = ArdourProgram::dump(session.folder(), New, samples.former);
-    const ArdourDump after = ArdourProgram::dump(session.folder(), "next", samples.fresh);
-    EXPECT_EQ(after.complaints, before.complaints);
-    expectTheSameRegions(after, before, Film);
-    expectTheSameValues(after, before, samples);
 }
 
 std::string versionOf(const std::filesystem::path& session)

@@ -132,6 +132,12 @@ protected:
     }
     ~HostRunTest() override { host.adapter().removeListener(&heard); }
 
+    core::EventList listOfFirst()
+    {
+        core::EventList list;
+        list.add(host.model().changeEdl().eventAt(0));
+        return list;
+    }
     Entries entriesBeforeAnd(std::initializer_list<std::u16string> names) const
     {
         Entries entries = entriesBefore;
@@ -522,6 +528,88 @@ TEST_P(HostRunTest, HasTheBoundsOfItsOwnRequestAlone)
     host.idle();
 
     EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+//     film         0         10         20
+//     before       |--- 1 ---|--- 2 ---|
+//     its list               |--- 1 ---|
+//     after        |--- 1 ---|--- 1 ---|
+TEST_P(HostRunTest, IsOneEntryOfTheUndoListTogetherWithTheListOfItsRequest)
+{
+    const auto listed = [this] {
+        Texts texts;
+        for (const auto& event : host.model().changeEdl().events())
+            texts.push_back(event->srcIn().toString() + " " + event->dstIn().toString());
+        return texts;
+    };
+    const Texts before = listed();
+    ASSERT_EQ(before.size(), 2U);
+    const core::EventList first(listOfFirst());
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(10.0), AdaptedHost::onClock(20.0)}, first),
+              Result::Ok);
+    EXPECT_EQ(listed(), before) << "It changes with the run.";
+    host.idle();
+
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel"}));
+    for (int round = 0; round < 2; ++round) {
+        EXPECT_EQ(listed(), Texts{"01:00:00:00 01:00:10:00"});
+        EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "one 10-20"}));
+        ASSERT_TRUE(host.undo());
+        EXPECT_EQ(listed(), before);
+        EXPECT_EQ(host.contentOf(track), (Texts{"one 0-10", "two 10-20"}));
+        ASSERT_TRUE(host.redo());
+    }
+}
+
+TEST_P(HostRunTest, LeavesTheListAsItIsWhenItIsCancelledOrItsRequestIsDropped)
+{
+    const std::string before = requestRun();
+    const auto request = [this] {
+        return host.adapter().startCadrelWithin({AdaptedHost::onClock(10.0), AdaptedHost::onClock(20.0)},
+                                                listOfFirst());
+    };
+    ASSERT_EQ(request(), Result::Ok);
+    host.adapter().setPreviewActive(false);
+    host.idle();
+    EXPECT_EQ(host.model().changeEdl().size(), 2U);
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+    EXPECT_EQ(heard.dropped, std::vector{true});
+
+    const auto progress = watch();
+    progress->whenCalled = [&] {
+        if (host.isEditOpen())
+            progress->cancel();
+    };
+    ASSERT_EQ(request(), Result::Ok);
+    host.idle();
+    EXPECT_EQ(heard.results.back(), Result::Cancelled);
+    EXPECT_EQ(host.model().changeEdl().size(), 2U);
+    EXPECT_EQ(host.undoNames(), entriesBefore);
+    EXPECT_EQ(host.bytes(), before);
+}
+
+TEST_P(HostRunTest, HasTheListOfItsOwnRequestAlone)
+{
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(10.0), AdaptedHost::onClock(20.0)}, listOfFirst()),
+              Result::Ok);
+    ASSERT_EQ(host.adapter().startCadrel(), Result::Ok);
+    host.idle();
+
+    EXPECT_EQ(host.model().changeEdl().size(), 2U);
+    EXPECT_EQ(host.contentOf(track), (Texts{"two 0-10", "one 10-20"}));
+}
+
+TEST_P(HostRunTest, TakesItsListBackWithTheUndoOfWhatItHasDoneBeforeItFailed)
+{
+    ASSERT_EQ(host.adapter().startCadrelWithin({AdaptedHost::onClock(10.0), AdaptedHost::onClock(20.0)}, listOfFirst()),
+              Result::Ok);
+    host.altered.hide(ClassId::ObjectList);
+    host.idle();
+
+    ASSERT_EQ(heard.results, Results{Result::HostObjectMissing});
+    EXPECT_EQ(host.undoNames(), entriesBeforeAnd({u"Apply Cadrel (incomplete)"}));
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(host.model().changeEdl().size(), 2U);
 }
 
 TEST_P(HostRunTest, TellsWhatStandsOnTheTracksThatItChanges)

@@ -296,9 +296,11 @@ void WholeJobTest::saveList()
 void WholeJobTest::conform()
 {
     EXPECT_EQ(messages(), "");
+    const std::size_t before = stepsDone();
     click(Main, "Cadrel Button");
     expectSoon("the run is done", [&] { return clipsOn(u"FX") != Effects; });
-    EXPECT_EQ(m_project->undoList().nameAt(stepsDone() - 1), u"Apply Cadrel");
+    expectEntry(before + 1, u"Apply Cadrel");
+    EXPECT_NE(events(ListKind::Change), ChangeEvents) << "What stays in its place has left the list.";
     EXPECT_EQ(clipsOn(u"FX"), ConformedEffects);
     EXPECT_EQ(clipsOn(u"Wind"), ConformedWind);
     const std::string told = messages();
@@ -310,11 +312,14 @@ void WholeJobTest::conform()
 void WholeJobTest::undoAndRedoTheRun()
 {
     const std::size_t done = stepsDone();
+    const Texts carriedOut = events(ListKind::Change);
     undo(done - 1);
+    EXPECT_EQ(events(ListKind::Change), ChangeEvents);
     EXPECT_EQ(clipsOn(u"FX"), Effects);
     EXPECT_EQ(clipsOn(u"Wind"), Wind);
     m_user.press('z', XK_Control_L, XK_Shift_L);
     expectSoon("the run is made again", [&] { return stepsDone() == done; });
+    EXPECT_EQ(events(ListKind::Change), carriedOut);
     EXPECT_EQ(clipsOn(u"FX"), ConformedEffects);
     EXPECT_EQ(clipsOn(u"Wind"), ConformedWind);
 }

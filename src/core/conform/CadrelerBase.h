@@ -40,6 +40,8 @@ public:
     virtual util::Result::Type startCadrel() = 0;
     /// Likewise, but the run changes nothing outside of the bounds, in seconds of the project's clock.
     virtual util::Result::Type startCadrelWithin(const SecondsRange& bounds) = 0;
+    /// The same of another list, which takes the place of the change list when the run begins. Its undo brings back the former.
+    virtual util::Result::Type startCadrelWithin(const SecondsRange& bounds, const EventList& changeList) = 0;
     /// Where clips, markers and automation points stand on the tracks that a run changes, in seconds of the project's clock;
     /// an instant begins where it ends. In any order.
     virtual std::vector<SecondsRange> getMaterial() = 0;

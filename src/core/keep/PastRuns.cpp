@@ -107,13 +107,16 @@ FrameRanges reelsOf(const FrameRanges& lit, const Framerate& framerate)
 }
 
 /// The first frame of a reel at which `standing` and `given` differ, if the given cut is the one that the run began with.
-std::optional<std::int32_t> differenceOfRepeatedRun(const PictureLine& began, const PictureLine& standing,
+/// `began` is called for that one only where they do.
+template <class Began>
+std::optional<std::int32_t> differenceOfRepeatedRun(const Began& began, const PictureLine& standing,
                                                     const PictureLine& given, const FrameRange& reel)
 {
-    const bool isGivenAgain =
-        PictureComparison(began, given).differencesUnder(0, reel).empty() && !within(reel, given.lit()).empty();
     const FrameRanges differences = PictureComparison(standing, given).differencesUnder(0, reel);
-    return isGivenAgain && !differences.empty() ? std::optional(differences.front().start) : std::nullopt;
+    if (differences.empty() || within(reel, given.lit()).empty())
+        return std::nullopt;
+    const bool isGivenAgain = PictureComparison(began(), given).differencesUnder(0, reel).empty();
+    return isGivenAgain ? std::optional(differences.front().start) : std::nullopt;
 }
 
 FrameRanges common(const FrameRanges& a, const FrameRanges& b)
@@ -183,17 +186,25 @@ std::optional<std::int32_t> PastRuns::firstDifference(const EventList& oldCut, c
     FrameRanges hidden;
     for (auto run = m_runs.rbegin(); run != m_runs.rend(); ++run) {
         if (run->isOfCuts()) {
-            const PictureLine began(*run->oldCut, names, framerate);
+            std::optional<PictureLine> oldLine;
+            // Mostly nobody asks for it.
+            const auto began = [&]() -> const PictureLine& {
+                return oldLine ? *oldLine : oldLine.emplace(*run->oldCut, names, framerate);
+            };
             const PictureLine standing(*run->newCut, names, framerate);
             const FrameRanges changed = common(within(run->allowed, reelsOf(standing.lit(), framerate)), givenReels);
-            const FrameRanges unchanged = common(without(reelsOf(began.lit(), framerate), {run->allowed}), givenReels);
+            const FrameRanges unchanged =
+                run->allowed == AllTime
+                    ? FrameRanges()
+                    : common(without(reelsOf(began().lit(), framerate), {run->allowed}), givenReels);
             if (const auto difference = firstDifferenceIn(without(changed, hidden), standing, given))
                 return difference;
             // Where a run could change nothing, an earlier one may have.
             FrameRanges elsewhere = hidden;
             for (auto earlier = std::next(run); earlier != m_runs.rend(); ++earlier)
                 elsewhere = both(std::move(elsewhere), earlier->extent);
-            if (const auto difference = firstDifferenceIn(without(unchanged, elsewhere), began, given))
+            if (const auto difference =
+                    unchanged.empty() ? std::nullopt : firstDifferenceIn(without(unchanged, elsewhere), began(), given))
                 return difference;
             for (const FrameRange& reel : common(without(run->extent, hidden), asked)) {
                 if (const auto difference = differenceOfRepeatedRun(began, standing, given, reel))

@@ -66,6 +66,7 @@ std::vector<PictureLine::Edge> PictureLine::edgesOf(const EventList& events, Pic
                                                     const Framerate& framerate)
 {
     std::vector<Edge> edges;
+    edges.reserve(2 * events.size());
     const auto add = [&edges](const FrameRange& frames, const PictureLayer& layer) {
         if (frames.isEmpty())
             return;

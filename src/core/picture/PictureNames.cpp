@@ -45,7 +45,20 @@ bool PictureNames::hasReadableSource(const EventBase& event, const Framerate& fr
 
 std::int32_t PictureNames::numberOf(const EventBase& event, const Framerate& framerate)
 {
-    return m_numbers.numberOf(textOf(event, framerate));
+    if (!isToldByName(event, framerate))
+        return m_numbers.numberOf(textOf(event, framerate));
+    // Nearly all events are such, and many have one name.
+    const std::string& name = nameBy(m_matchBy, event);
+    const auto known = m_numbersOfNames.find(name);
+    if (known != m_numbersOfNames.end())
+        return known->second;
+    return m_numbersOfNames.emplace(name, m_numbers.numberOf(matchedName(name))).first->second;
+}
+
+/// Whether nothing but the name makes up the text.
+bool PictureNames::isToldByName(const EventBase& event, const Framerate& framerate)
+{
+    return !event.hasFlaw(EventFlaw::RollNameInvalid) && hasReadableSource(event, framerate);
 }
 
 std::int32_t PictureNames::numberOfTransition(const EventBase& event, const EventBase* outgoing,

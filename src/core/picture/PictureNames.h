@@ -34,6 +34,7 @@ public:
     static bool hasReadableSource(const EventBase& event, const Framerate& framerate);
 
 private:
+    static bool isToldByName(const EventBase& event, const Framerate& framerate);
     std::string textOf(const EventBase& event, const Framerate& framerate);
     const std::string& matchedName(const std::string& name);
 
@@ -41,6 +42,7 @@ private:
     VfxNameMatcher m_versionPatterns;
     std::unordered_map<std::string, std::string> m_matchedNames;
     TextNumbers m_numbers;
+    std::unordered_map<std::string, std::int32_t> m_numbersOfNames; ///< of events that are told by their names alone
 };
 
 } // namespace cadrel::core

@@ -135,13 +135,9 @@ void ProtectedRun::putListInto(DataModel& model) const
     model.changeEdl() = listOf(m_plan.events, model);
 }
 
-void ProtectedRun::putStartableListInto(DataModel& model) const
+EventList ProtectedRun::startableList(const DataModel& model) const
 {
-    if (m_source == Source::Given || !m_plan.events.empty()) {
-        putListInto(model);
-        return;
-    }
-    model.changeEdl() = listOf(m_plan.untouched, model);
+    return listOf(m_plan.events.empty() ? m_plan.untouched : m_plan.events, model);
 }
 
 EventList ProtectedRun::carried(const DataModel& model) const

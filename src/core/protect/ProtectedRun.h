@@ -37,9 +37,9 @@ public:
 
     /// The list that is carried out takes the place of a generated change list; a given one stays.
     void putListInto(DataModel& model) const;
-    /// The same, but where that list is empty, what stays takes the place, outside of the bounds: a run doesn't begin without
-    /// an event.
-    void putStartableListInto(DataModel& model) const;
+    /// The list that is carried out in the place of a generated one. Where it would be empty, it has what stays, outside of the
+    /// bounds: a run doesn't begin without an event.
+    EventList startableList(const DataModel& model) const;
     /// Whether there is an event for that.
     bool isStartable() const { return !m_plan.events.empty() || !m_plan.untouched.empty(); }
     /// The list of all that has old sound in the new programme: what is carried out, and what stays. Empty for a given list.

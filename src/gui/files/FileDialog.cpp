@@ -15,6 +15,7 @@
 #include "util/StringUtil.h"
 
 #include <optional>
+#include <utility>
 
 namespace cadrel::gui {
 
@@ -178,6 +179,7 @@ void FileDialog::showFor(std::int32_t listType)
 {
     m_listType = listType;
     m_taken = std::make_shared<TakenFiles>(listType);
+    m_isOkWaiting = false;
     m_title.setText(translatedText(titleFor(listType)), juce::dontSendNotification);
     setTitle(m_title.getText());
     setVisible(true);
@@ -272,8 +274,29 @@ void FileDialog::takeFiles(const std::vector<std::string>& paths)
     if (!self || taken.expired())
         return;
     refresh();
-    if (!m_taken->isEmpty() && isShowing())
-        m_okButton.grabKeyboardFocus();
+    if (m_taken->isEmpty() || !isShowing())
+        return;
+    m_okButton.grabKeyboardFocus();
+    // The window may have no keyboard yet when the file box has just closed.
+    m_isOkWaiting = !m_okButton.hasKeyboardFocus(false);
+}
+
+juce::Component* FileDialog::firstFocus()
+{
+    if (m_taken && !m_taken->isEmpty())
+        return &m_okButton;
+    return &m_openFilesButton;
+}
+
+/// A window that gets the keyboard back gives it to what had it before the file box.
+void FileDialog::focusOfChildComponentChanged(FocusChangeType cause)
+{
+    guardSystem([&] {
+        if (!hasKeyboardFocus(true) || !std::exchange(m_isOkWaiting, false))
+            return;
+        if (cause != focusChangedByMouseClick && m_taken)
+            m_okButton.grabKeyboardFocus();
+    });
 }
 
 void FileDialog::refresh()

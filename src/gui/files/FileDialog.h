@@ -56,6 +56,7 @@ public:
     void setVisible(bool shouldBeVisible) override;
     void resized() override;
     void enablementChanged() override;
+    void focusOfChildComponentChanged(FocusChangeType cause) override;
     void paintOverChildren(juce::Graphics& graphics) override;
     void buttonClicked(juce::Button* button) override;
     void timecodeChanged(TcInput& input) override;
@@ -69,7 +70,7 @@ protected:
     void confirm() override;
     void cancel() override;
     juce::Rectangle<int> panel() const override;
-    juce::Component* firstFocus() override { return &m_openFilesButton; }
+    juce::Component* firstFocus() override;
 
 private:
     /// What belongs to one side of the events.
@@ -103,6 +104,7 @@ private:
     std::shared_ptr<TakenFiles> m_taken; ///< null while the sheet is closed
     std::wstring m_lastFolder;
     bool m_isDropTarget = false;
+    bool m_isOkWaiting = false; ///< for the keyboard of the window
     Side m_destination;
     Side m_source; ///< only for the change EDL
     SheetLabel m_title;

@@ -10,6 +10,7 @@
 #include "core/settings/VfxNameMatcher.h"
 #include "gui/guard/Guard.h"
 #include "gui/look/ShownText.h"
+#include "gui/main/GenerationSettings.h"
 #include "util/FilledText.h"
 #include "util/Result.h"
 #include "util/Utf8Text.h"
@@ -90,6 +91,7 @@ std::wstring CutCommands::generate(DataModel& model)
         return FailureAnswer::PassOver;
     };
     const auto command = core::createDataModelCommand(translated(L"Generate Change EDL"));
+    GenerationSettings::keep(model);
     const Result::Type result = model.generateChangeEdl(passOver);
     if (result != Result::Ok)
         return failureText(result, model);

@@ -51,12 +51,21 @@ std::wstring KeepQuestion::text() const
         amountText(FallsOut, m_run.protectedMaterial(), m_framerate) + L"\n" +
         translated(L"It stands outside of the cuts, under black or under picture that is the same.");
     if (canKeep())
-        return start + doubts();
+        return start + doubts() + changeOfList();
     const FrameRanges material = m_run.plan().refusal ? m_run.plan().refusal->material : FrameRanges();
     return start + L"\n" +
            (material.empty()
                 ? translated(L"It can't be kept, since nothing of the old cut is left.")
                 : amountText(L"It can't be kept: %s would have to move out of the day.", material, m_framerate));
+}
+
+std::wstring KeepQuestion::changeOfList() const
+{
+    if (m_run.source() == core::ProtectedRun::Source::Given || !m_run.needsRun())
+        return {};
+    return L"\n" +
+           translated(L"If you keep it, the Change EDL is written anew: events that stay in their place leave it, and "
+                      L"the others get new numbers.");
 }
 
 std::wstring KeepQuestion::doubts() const

@@ -29,6 +29,7 @@ public:
 
 private:
     std::wstring doubts() const;
+    std::wstring changeOfList() const;
 
     const core::ProtectedRun& m_run;
     core::Framerate m_framerate;

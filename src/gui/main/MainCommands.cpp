@@ -4,6 +4,7 @@
 
 #include "core/model/DataModel.h"
 #include "gui/look/ShownText.h"
+#include "gui/main/GenerationSettings.h"
 #include "util/Result.h"
 
 namespace cadrel::gui {
@@ -62,7 +63,16 @@ std::wstring MainCommands::purpose(MainButton button)
 std::wstring MainCommands::tooltip(MainButton button) const
 {
     const wchar_t* const reason = obstacle(button);
-    return reason ? translated(reason) : purpose(button);
+    if (reason)
+        return translated(reason);
+    if (button == MainButton::Generate && isListOutdated())
+        return translated(L"The settings have changed since the Change EDL was generated. Press to generate it anew.");
+    return purpose(button);
+}
+
+bool MainCommands::isListOutdated() const
+{
+    return m_model && GenerationSettings::haveChanged(*m_model);
 }
 
 const wchar_t* MainCommands::obstacle(MainButton button) const

@@ -19,6 +19,8 @@ public:
     explicit MainCommands(const core::DataModel* model) : m_model(model) {}
 
     bool allows(MainButton button) const;
+    /// Whether the settings would give another list than the one that was generated.
+    bool isListOutdated() const;
     /// What the button does, in the user's language.
     static std::wstring purpose(MainButton button);
     /// What the button does, or why it can't do that now, in the user's language.

@@ -26,6 +26,8 @@ constexpr int HintFont = 10;
 constexpr float PanelCorner = 8.0F;
 constexpr float FrameThickness = 2.0F;
 const juce::Colour Background(0xff070c10);
+constexpr float DotSize = 6.0F;
+constexpr float DotMargin = 4.0F;
 /// How much space there is beside a hint.
 constexpr int HintMargin = 20;
 constexpr std::array Lists{ListKind::Old, ListKind::New, ListKind::Change};
@@ -252,6 +254,14 @@ void MainControls::setHint(std::int32_t listKind, const std::wstring& hint)
     repaint();
 }
 
+void MainControls::setListOutdated(bool flag)
+{
+    if (m_isListOutdated == flag)
+        return;
+    m_isListOutdated = flag;
+    repaint(button(MainButton::Generate).getBounds());
+}
+
 void MainControls::resized()
 {
     guardSystem([this] {
@@ -307,9 +317,19 @@ bool MainControls::isBeneathSheet() const
     return !isEnabled() && getParentComponent() && getParentComponent()->isEnabled();
 }
 
+/// In the upper right corner of the button.
+void MainControls::paintDot(juce::Graphics& graphics) const
+{
+    const juce::Rectangle<float> place = button(MainButton::Generate).getBounds().toFloat().reduced(DotMargin);
+    graphics.setColour(toColour(Palette::orange).withAlpha(opacityOf(*this)));
+    graphics.fillEllipse(place.getRight() - DotSize, place.getY(), DotSize, DotSize);
+}
+
 void MainControls::paintOverChildren(juce::Graphics& graphics)
 {
     guardSystem([&] {
+        if (m_isListOutdated)
+            paintDot(graphics);
         for (const std::int32_t listKind : Lists) {
             const juce::String& hint = m_hints.at(static_cast<std::size_t>(listKind));
             const juce::Rectangle<int> table = toRectangle(layout().table(listKind));

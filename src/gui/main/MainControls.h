@@ -49,6 +49,8 @@ public:
     EventTimeLineView& timeline() { return m_timeline; }
     VideoDisplay& video() { return m_video; }
 
+    /// A dot on the button that generates the list says that the settings have changed since.
+    void setListOutdated(bool flag);
     /// What stands in the empty table of a list, in the user's language; empty for nothing.
     void setHint(std::int32_t listKind, const std::wstring& hint);
 
@@ -71,6 +73,7 @@ private:
     void setUpToggles();
     void paintPanel(juce::Graphics& graphics, std::int32_t listKind) const;
     bool isBeneathSheet() const;
+    void paintDot(juce::Graphics& graphics) const;
     void setDropTarget(std::optional<std::int32_t> listKind);
     std::optional<std::int32_t> listAt(juce::Point<int> place) const;
     MainLayout layout() const { return {getWidth(), getHeight()}; }
@@ -80,6 +83,7 @@ private:
     std::array<std::unique_ptr<juce::Button>, MainButtonCount> m_buttons;
     EventTimeLineView m_timeline;
     VideoDisplay m_video;
+    bool m_isListOutdated = false;
     std::array<juce::String, ListCount> m_hints;
     std::optional<std::int32_t> m_dropTarget; ///< the list over which files are
 };

@@ -119,6 +119,19 @@ void MainGui::focusGained(FocusChangeType)
     });
 }
 
+/// A window that gets the keyboard back gives it to what had it before, even if a sheet has come up over it since.
+void MainGui::focusOfChildComponentChanged(FocusChangeType)
+{
+    guardSystem([this] {
+        if (!m_controls.hasKeyboardFocus(true) || m_controls.isEnabled())
+            return;
+        for (Sheet* const sheet : sheets()) {
+            if (sheet->isVisible())
+                sheet->takeFocus();
+        }
+    });
+}
+
 bool MainGui::keyPressed(const juce::KeyPress& key)
 {
     const bool isLeft = key == juce::KeyPress(juce::KeyPress::leftKey);
@@ -208,6 +221,7 @@ void MainGui::componentVisibilityChanged(juce::Component& component)
     guardUser([this] {
         if (!m_model)
             return;
+        showCommands();
         const std::wstring obstacle = CutCommands::obstacleOfNames(*m_model);
         if (obstacle.empty())
             m_model->applyVfxHandling();

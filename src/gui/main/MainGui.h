@@ -32,6 +32,7 @@ class Timecode;
 
 namespace cadrel::gui {
 
+class AlertWindowBase;
 class VideoProviderBase;
 
 /// The window of Cadrel. It shows the model that its notifier names, asks the engine for what is to be done, and draws itself
@@ -72,6 +73,7 @@ public:
     void resized() override;
     bool keyPressed(const juce::KeyPress& key) override;
     void focusGained(FocusChangeType cause) override;
+    void focusOfChildComponentChanged(FocusChangeType cause) override;
 
 private:
     // What happens; in MainGui.cpp.
@@ -138,9 +140,8 @@ private:
     Protection answerTo(PlannedRun& planned, const std::wstring& question, bool canKeep);
     /// Whether the user wants the run though it doesn't go on from where the sound stands.
     bool mayRepeat(PlannedRun& planned, const std::wstring& question);
-    /// The button that the user has pressed, counted from 1; 0 when no run can begin any more.
-    std::int32_t askBeforeRun(PlannedRun& planned, const std::wstring& question,
-                              const std::vector<const wchar_t*>& buttons);
+    /// False when no run can begin any more. This may be gone then.
+    bool askBeforeRun(PlannedRun& planned, const std::function<void(AlertWindowBase& alerts)>& ask);
     void requestRun(Protection protection, const core::ProtectedRun& run);
     util::Result::Type requestKeptRun(const core::ProtectedRun& run);
     void noteRun();

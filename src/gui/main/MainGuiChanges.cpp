@@ -32,7 +32,8 @@ void MainGui::handle(const ChangeContext& context)
     case ChangeContext::DataModelChanged:
         return setModel(static_cast<const core::DataModelChangeContext&>(context).dataModel);
     case ChangeContext::SettingsChanged:
-        return m_settingsDialog.setSettings(m_model ? &m_model->settings() : nullptr);
+        m_settingsDialog.setSettings(m_model ? &m_model->settings() : nullptr);
+        return showCommands();
     case ChangeContext::EventListChanged:
         return listReplaced(static_cast<const core::EventListChangeContext&>(context).listKind);
     case ChangeContext::VideoListChanged:
@@ -221,6 +222,7 @@ void MainGui::showCommands()
         if (button.getTooltip() != tooltip)
             button.setTooltip(tooltip);
     }
+    m_controls.setListOutdated(commands.isListOutdated());
     for (const std::int32_t listKind : {ListKind::Old, ListKind::New, ListKind::Change})
         m_controls.setHint(listKind, emptyListHint(m_model, listKind));
 }

@@ -24,7 +24,6 @@
 #include "gui/services/FileBrowserDialogBase.h"
 #include "util/StringUtil.h"
 
-#include <cstddef>
 #include <utility>
 
 namespace cadrel::gui {
@@ -86,11 +85,8 @@ void MainGui::save()
     const std::wstring path = util::StringUtil::toWide(chosen.back());
     const SavedChangeEdl saved(m_model->changeEdl(), path);
     const std::wstring question = saved.question();
-    if (!question.empty()) {
-        constexpr std::int32_t Overwrite = 1;
-        if (AlertWindowBase::instance().show(question, L"Overwrite", L"Cancel", {}) != Overwrite || !mayGoOn())
-            return;
-    }
+    if (!question.empty() && (!AlertWindowBase::instance().confirm(question, L"Overwrite") || !mayGoOn()))
+        return;
     saved.write();
     m_saveFolder = folderOfFile(path);
 }
@@ -151,39 +147,39 @@ bool MainGui::askOrRequestRun(Answers& answers)
 
 MainGui::Protection MainGui::answerTo(PlannedRun& planned, const std::wstring& question, bool canKeep)
 {
-    // The first button is the one that Return presses.
-    using Choices = std::vector<std::pair<const wchar_t*, Protection>>;
-    const Choices choices =
-        canKeep
-            ? Choices{{L"Keep", Protection::Kept}, {L"Don't Keep", Protection::Plain}, {L"Cancel", Protection::None}}
-            : Choices{{L"Cancel", Protection::None}, {L"Don't Keep", Protection::Plain}};
-    std::vector<const wchar_t*> buttons;
-    for (const auto& [button, protection] : choices)
-        buttons.push_back(button);
-    const std::int32_t pressed = askBeforeRun(planned, question, buttons);
-    return pressed == 0 ? Protection::None : choices[static_cast<std::size_t>(pressed) - 1].second;
+    constexpr std::int32_t Keep = 1;
+    constexpr std::int32_t DontKeep = 2;
+    Protection answer = Protection::None;
+    const bool mayStart = askBeforeRun(planned, [&](AlertWindowBase& alerts) {
+        if (!canKeep)
+            answer = alerts.confirm(question, L"Don't Keep") ? Protection::Plain : Protection::None;
+        else if (const std::int32_t pressed = alerts.show(question, L"Keep", L"Don't Keep", L"Cancel"); pressed == Keep)
+            answer = Protection::Kept;
+        else if (pressed == DontKeep)
+            answer = Protection::Plain;
+    });
+    return mayStart ? answer : Protection::None;
 }
 
 bool MainGui::mayRepeat(PlannedRun& planned, const std::wstring& question)
 {
-    constexpr std::int32_t StartAnyway = 2;
-    return askBeforeRun(planned, question, {L"Cancel", L"Start Anyway"}) == StartAnyway;
+    bool isWanted = false;
+    const bool mayStart =
+        askBeforeRun(planned, [&](AlertWindowBase& alerts) { isWanted = alerts.confirm(question, L"Start Anyway"); });
+    return mayStart && isWanted;
 }
 
-std::int32_t MainGui::askBeforeRun(PlannedRun& planned, const std::wstring& question,
-                                   const std::vector<const wchar_t*>& buttons)
+bool MainGui::askBeforeRun(PlannedRun& planned, const std::function<void(AlertWindowBase& alerts)>& ask)
 {
     const juce::Component::SafePointer<MainGui> self(this);
     const core::DataModel* const model = m_model;
     planned.remember(*m_model);
-    const std::int32_t pressed = AlertWindowBase::instance().show(question, buttons[0], buttons[1],
-                                                                  buttons.size() > 2 ? buttons[2] : std::wstring());
+    ask(AlertWindowBase::instance());
     const bool isSame = self && m_model == model && m_model && isEnabled() && m_controls.isEnabled();
-    const bool isButton = pressed >= 1 && pressed <= static_cast<std::int32_t>(buttons.size());
-    if (!isSame || !isButton || m_engine->canStart() != Result::Ok)
-        return 0;
+    if (!isSame || m_engine->canStart() != Result::Ok)
+        return false;
     planned.lookAgain(*m_model);
-    return pressed;
+    return true;
 }
 
 /// The sound stands in the new cut as it is.
@@ -210,21 +206,12 @@ void MainGui::requestRun(Protection protection, const core::ProtectedRun& run)
     updateEnablement();
 }
 
-/// The run begins later. So the list changes only when there will be a run.
+/// A generated list changes with the run, so that both are one entry of the undo list.
 Result::Type MainGui::requestKeptRun(const core::ProtectedRun& run)
 {
-    const Result::Type answer = m_engine->startCadrelWithin(run.bounds());
-    if (answer != Result::Ok || run.source() == core::ProtectedRun::Source::Given)
-        return answer;
-    try {
-        const auto command = core::createDataModelCommand(translated(L"Keep Sound outside of the Change EDL"));
-        run.putStartableListInto(*m_model);
-    } catch (...) {
-        // That drops what is requested.
-        m_engine->setPreviewActive(false);
-        throw;
-    }
-    return answer;
+    if (run.source() == core::ProtectedRun::Source::Given)
+        return m_engine->startCadrelWithin(run.bounds());
+    return m_engine->startCadrelWithin(run.bounds(), run.startableList(*m_model));
 }
 
 // ---- The preview ---------------------------------------------------------------------------------------------------

@@ -4,6 +4,7 @@
 
 #include "core/settings/VfxNameMatcher.h"
 #include "gui/guard/Guard.h"
+#include "gui/look/ButtonTile.h"
 #include "gui/look/Text.h"
 #include "util/Utf8Text.h"
 
@@ -414,10 +415,12 @@ void SettingsDialog::refreshVfx(bool isAnother)
 {
     const juce::String flaw = translatedText(L"Use only the letters A to Z, digits and . * - _");
     const juce::String hint = translatedText(L"* stands for any one character");
+    const juce::String unused = translatedText(L"Tick the row to use this name.");
     bool isFlawed = false;
     for (const auto& row : m_vfxRows) {
         const VfxPatternEntry entry = vfxRow(*m_settings, row->row);
         row->box.setToggleState(entry.enabled, juce::dontSendNotification);
+        row->versionLabel.setEnabled(entry.enabled);
         for (VfxText* const text : {&row->prefix, &row->postfix}) {
             const std::string& stored = entry.*text->part;
             if (isAnother || text->shown != shownText(stored)) {
@@ -425,7 +428,8 @@ void SettingsDialog::refreshVfx(bool isAnother)
                 text->editor.setText(text->shown, false);
             }
             const bool isWrong = entry.enabled && isRefused(stored);
-            text->editor.setTooltip(isWrong ? flaw : hint);
+            text->editor.setTooltip(!entry.enabled ? unused : isWrong ? flaw : hint);
+            text->editor.setAlpha(entry.enabled ? 1.0F : DisabledOpacity);
             isFlawed = isFlawed || isWrong;
         }
     }

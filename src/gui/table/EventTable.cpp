@@ -76,7 +76,9 @@ juce::Component* EventTable::refreshComponentForRow(int row, bool isSelected, ju
 bool EventTable::keyPressed(const juce::KeyPress& key)
 {
     bool isUsed = false;
-    guardUser([&] { isUsed = handleKey(key); });
+    // A window that gets the keyboard back may give it to a table that is beneath a sheet by now.
+    if (isEnabled())
+        guardUser([&] { isUsed = handleKey(key); });
     return isUsed;
 }
 

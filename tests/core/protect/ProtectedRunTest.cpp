@@ -121,12 +121,13 @@ TEST_F(ProtectedRunTest, HasAnEventToStartWithWhereAReelOnlyGoes)
     EXPECT_TRUE(run.isStartable());
     run.putListInto(m_model);
     EXPECT_TRUE(m_model.changeEdl().isEmpty());
-    run.putStartableListInto(m_model);
+    const core::EventList startable = run.startableList(m_model);
 
     // The pop stays, and so does the reel after it.
-    ASSERT_EQ(m_model.changeEdl().size(), 2U);
-    EXPECT_EQ(m_model.changeEdl().at(0).dstOut().toString(), "00:59:59:00");
-    EXPECT_EQ(m_model.changeEdl().at(1).dstOut().toString(), "01:00:10:00");
+    ASSERT_EQ(startable.size(), 2U);
+    EXPECT_EQ(startable.at(0).dstOut().toString(), "00:59:59:00");
+    EXPECT_EQ(startable.at(1).dstOut().toString(), "01:00:10:00");
+    EXPECT_TRUE(m_model.changeEdl().isEmpty());
 }
 
 TEST_F(ProtectedRunTest, LeavesAGivenListAsItIs)

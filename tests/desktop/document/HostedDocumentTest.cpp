@@ -101,8 +101,7 @@ protected:
             model.newEdl().add(makeEvent("B", "11:00:00:00", "11:00:02:00", taken, newEnd, 2));
         EXPECT_EQ(model.generateChangeEdl(), cadrel::util::Result::Ok);
         const ProtectedRun run(model, {{0.0, 4.0}}, ProtectedRun::Source::Generated);
-        EXPECT_EQ(host->startCadrelWithin(run.bounds()), cadrel::util::Result::Ok);
-        run.putStartableListInto(model);
+        EXPECT_EQ(host->startCadrelWithin(run.bounds(), run.startableList(model)), cadrel::util::Result::Ok);
         application.idle();
         EXPECT_TRUE(documents.save(document).isSaved());
         return savedEnd();

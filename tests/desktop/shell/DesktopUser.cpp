@@ -256,6 +256,16 @@ unsigned long DesktopUser::trackColour(const standin::Project& project, std::siz
     return m_windows.colourAt(place.x, place.y);
 }
 
+void DesktopUser::clickTab(int tab)
+{
+    constexpr int TabWidth = 240;
+    constexpr int IntoTheTab = 60;
+    const Pixel origin = originOf(m_window);
+    m_user.moveTo(origin.x + tab * TabWidth + IntoTheTab,
+                  origin.y + ShellLayout::MenuHeight + ShellLayout::TabHeight / 2);
+    m_user.click();
+}
+
 void DesktopUser::clickChangeEvent(int row)
 {
     const WindowPlaces::Place first = m_places.at(Main, "Change Table List Box Row");

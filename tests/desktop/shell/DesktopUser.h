@@ -52,6 +52,8 @@ public:
     void clickTrack(const standin::Project& project, std::size_t row, double seconds);
     /// What stands there in the band with the names of clips, as 0xRRGGBB.
     unsigned long trackColour(const standin::Project& project, std::size_t row, double seconds) const;
+    /// On the name of a project, counted from 0.
+    void clickTab(int tab);
     /// On an event of the change list, counted from 0.
     void clickChangeEvent(int row);
     /// In the second row of the videos, below the title of a column.
@@ -97,6 +99,8 @@ public:
     /// Waits until Cadrel's window shows both stills with these numbers in their bars.
     void waitForStills(int oldNumber, int newNumber);
 
+    /// What the window shows.
+    std::vector<char> pixels() const { return m_windows.pixelsOf(m_window); }
     /// Until what the window shows has stayed the same for so many turns of ten milliseconds or more.
     void waitForRest(int turns);
     std::string title() const;

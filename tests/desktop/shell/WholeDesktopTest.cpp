@@ -180,10 +180,11 @@ protected:
         model.generateChangeEdl();
         return timecodesOf(model.changeEdl());
     }
-    std::unique_ptr<core::DataModel> storedModel()
+    std::unique_ptr<core::DataModel> storedModel() const { return storedModel(m_file); }
+    static std::unique_ptr<core::DataModel> storedModel(const fs::path& file)
     {
         auto model = std::make_unique<core::DataModel>();
-        auto archive = cadrel::tests::archiveOf(cadrel::tests::StoredModel::inFile(m_file).value().block);
+        auto archive = cadrel::tests::archiveOf(cadrel::tests::StoredModel::inFile(file).value().block);
         archive >> *model;
         return model;
     }
@@ -439,6 +440,65 @@ TEST_P(WholeDesktopTest, GivesTheKeysToAQuestionHoweverItWasClickedFor)
     m_user->waitForBox(false);
     m_user->save();
     EXPECT_TRUE(isConformed());
+}
+
+TEST_P(WholeDesktopTest, ShowsNothingOfABoxBeneathTheNextOne)
+{
+    start();
+    addCuts();
+    m_user->click(DesktopUser::Main, "Generate Button");
+    m_user->waitForTitle("there is unsaved work", [](const std::string& text) { return text.starts_with("*"); });
+    std::vector<std::vector<char>> pictures;
+    for (const bool isRightAfter : {false, true}) {
+        m_user->waitForRest(40);
+        m_user->click(DesktopUser::Main, "Cadrel Button");
+        m_user->waitForBox(true);
+        m_user->waitForRest(20);
+        if (isRightAfter)
+            m_user->closeWindow();
+        m_user->press(XK_Escape);
+        if (!isRightAfter) {
+            m_user->waitForBox(false);
+            m_user->waitForRest(40);
+            m_user->closeWindow();
+            m_user->waitForBox(true);
+        }
+        m_user->waitForRest(40);
+        pictures.push_back(m_user->pixels());
+        m_user->press(XK_Escape);
+        m_user->waitForBox(false);
+    }
+    EXPECT_TRUE(pictures[0] == pictures[1]) << "It is the same question.";
+    EXPECT_TRUE(m_user->isRunning());
+}
+
+TEST_P(WholeDesktopTest, OpensTwoProjectsInTabsOfWhichEachHasAWorkOfItsOwn)
+{
+    const fs::path other = m_folder / "other.stage";
+    fs::copy_file(m_file, other);
+    m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string(), other.string()});
+    const auto waitForName = [&](const std::string& name) {
+        m_user->waitForTitle("it is " + name,
+                             [&](const std::string& text) { return text.ends_with(name + " - Cadrel"); });
+    };
+    waitForName("other.stage");
+    addCut("Load Old Edl Button", "reel3_v07.edl");
+    m_user->save();
+    m_user->clickTab(0);
+    waitForName("reel3.stage");
+    m_user->waitForRest(20);
+    addCut("Load New Edl Button", "reel3_v12.edl");
+    m_user->save();
+    EXPECT_TRUE(storedModel()->oldEdl().isEmpty());
+    EXPECT_EQ(storedModel()->newEdl().size(), 153U);
+
+    m_user->press('w', XK_Control_L);
+    waitForName("other.stage");
+    EXPECT_TRUE(m_user->isRunning());
+    m_user->press('q', XK_Control_L);
+    EXPECT_EQ(m_user->status(), 0);
+    EXPECT_EQ(storedModel(other)->oldEdl().size(), 152U);
+    EXPECT_TRUE(storedModel(other)->newEdl().isEmpty());
 }
 
 TEST_P(WholeDesktopTest, TakesADroppedEdlIntoTheTableOverWhichItWasLetGo)

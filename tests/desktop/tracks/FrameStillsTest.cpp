@@ -153,8 +153,9 @@ TEST_F(FrameStillsTest, AskAgainForAPictureOfAFileThatHasComeBack)
         file);
     ASSERT_TRUE(waitForOne());
     for (const std::uint32_t frame : {1U, 2U}) {
-        if (m_stills->still(*clip, frame, 40).isNull())
+        if (m_stills->still(*clip, frame, 40).isNull()) {
             EXPECT_TRUE(waitForOne());
+        }
         EXPECT_EQ(m_stills->still(*clip, frame, 40).getWidth(), 67) << "It is 320 by 192, and 40 high.";
     }
     EXPECT_EQ(m_stills->keptCount(), 2U);

@@ -130,6 +130,14 @@ TEST_F(EdlTakingTest, LeavesOutAFileThatTheUserAborts)
     EXPECT_EQ(m_taken->summary(), std::wstring(LineOfAReel) + L"b.edl\n");
 }
 
+TEST_F(EdlTakingTest, LeavesOutAFileOnEscape)
+{
+    m_alerts.key = RecordingAlerts::Key::Escape;
+    take({write("a.edl", withFrame("29"))});
+
+    EXPECT_TRUE(m_taken->isEmpty());
+}
+
 TEST_F(EdlTakingTest, TakesAFileOfALowerRateWithoutAWord)
 {
     const TestProject project(Framerate(30, 0));

@@ -448,6 +448,30 @@ TEST_F(FileDialogTest, AppendsTheFilesOnReturn)
     EXPECT_EQ(m_undo.entries, std::vector<std::wstring>{L"Load Change EDL"});
 }
 
+TEST_F(FileDialogTest, AppendsTheFilesOnReturnAlsoWhenTheFileBoxHadTheKeyboard)
+{
+    m_dialog->showForOldList();
+    m_window.loseKeyboard();
+    m_dialog->takeFiles({write("a.edl", fiveSecondsEdl())});
+    m_window.regainKeyboard();
+
+    EXPECT_TRUE(ok().hasKeyboardFocus(false));
+    m_window.press(juce::KeyPress::returnKey);
+    EXPECT_FALSE(isOpen());
+    EXPECT_EQ(m_model.oldEdl().size(), 1U);
+}
+
+TEST_F(FileDialogTest, LeavesTheKeyboardWhereTheUserPutsItAfterTheFileBox)
+{
+    m_dialog->showForOldList();
+    m_window.loseKeyboard();
+    m_dialog->takeFiles({write("a.edl", fiveSecondsEdl())});
+    m_window.regainKeyboard();
+    open().grabKeyboardFocus();
+
+    EXPECT_TRUE(open().hasKeyboardFocus(false));
+}
+
 TEST_F(FileDialogTest, OpensTheFileBoxOnReturnAtFirst)
 {
     m_dialog->showForOldList();

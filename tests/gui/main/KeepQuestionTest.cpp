@@ -58,6 +58,33 @@ TEST_F(KeepQuestionTest, TellsHowMuchWouldBeTakenAway)
               L"carry it.\nIt stands outside of the cuts, under black or under picture that is the same.");
 }
 
+TEST_F(KeepQuestionTest, TellsThatAGeneratedListIsWrittenAnew)
+{
+    const auto addShots = [](core::EventList& list, const char* endOfA, const char* between, const char* end) {
+        list.add(makeEvent("A001", "10:00:00:00", endOfA, "01:00:00:00", between));
+        list.add(makeEvent("B002", "12:00:00:00", "12:00:10:00", between, end));
+    };
+    addShots(m_model.oldEdl(), "10:00:10:00", "01:00:10:00", "01:00:20:00");
+    addShots(m_model.newEdl(), "10:00:08:00", "01:00:08:00", "01:00:18:00");
+    ASSERT_EQ(m_model.generateChangeEdl(), util::Result::Ok);
+    const ProtectedRun run = runWith({{Hour - 2, Hour - 1}});
+
+    EXPECT_TRUE(questionOf(run).text().ends_with(L"\nIf you keep it, the Change EDL is written anew: events that stay "
+                                                 L"in their place leave it, and the others get "
+                                                 L"new numbers."));
+}
+
+TEST_F(KeepQuestionTest, SaysNothingOfTheListWhereNoRunIsNeeded)
+{
+    for (core::EventList* const list : {&m_model.oldEdl(), &m_model.newEdl()})
+        list->add(makeEvent("A001", "10:00:00:00", "10:00:10:00", "01:00:00:00", "01:00:10:00"));
+    ASSERT_EQ(m_model.generateChangeEdl(), util::Result::Ok);
+    const ProtectedRun run = runWith({{Hour - 2, Hour - 1}});
+    ASSERT_TRUE(questionOf(run).isNeeded());
+
+    EXPECT_EQ(questionOf(run).text().find(L"written anew"), std::wstring::npos);
+}
+
 TEST_F(KeepQuestionTest, TellsWhatCannotBeKept)
 {
     addChange("01:00:00:00", "01:00:10:00", "01:00:05:00", "01:00:15:00");

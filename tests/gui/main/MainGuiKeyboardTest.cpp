@@ -3,6 +3,7 @@
 #include "tests/gui/main/ShownWindow.h"
 #include "tests/support/TempFolder.h"
 
+#include <initializer_list>
 #include <optional>
 
 namespace cadrel::tests {
@@ -67,6 +68,42 @@ TEST_F(MainGuiKeyboardTest, GoesToTheSheetThatIsOpen)
     m_gui->grabKeyboardFocus();
 
     EXPECT_TRUE(find<juce::Button>(fileDialog(), "Open Files Button").hasKeyboardFocus(true));
+}
+
+TEST_F(MainGuiKeyboardTest, StaysOutOfTheTableBeneathASheetThatCameUpWhileAnotherWindowHadIt)
+{
+    showThree();
+    select("Change", {1});
+    table("Change").grabKeyboardFocus();
+    m_window.loseKeyboard();
+    settingsDialog().setVisible(true);
+    m_window.regainKeyboard();
+
+    EXPECT_TRUE(settingsDialog().hasKeyboardFocus(true));
+    for (const int key : {juce::KeyPress::deleteKey, juce::KeyPress::backspaceKey, juce::KeyPress::downKey})
+        m_window.press(key);
+    EXPECT_EQ(list(ListKind::Change).size(), 3U);
+    EXPECT_EQ(selected("Change"), "1");
+    EXPECT_EQ(m_undo.begun, Texts());
+}
+
+TEST_F(MainGuiKeyboardTest, WorksNothingBeneathASheetWithKeysThatNobodyInItUses)
+{
+    showThree();
+    select("Change", {1});
+    click("m_videoRightToggle");
+    for (juce::Component* const sheet :
+         std::initializer_list<juce::Component*>{&settingsDialog(), &videosDialog(), &fileDialog(), &editDialog()}) {
+        sheet->setVisible(true);
+        EXPECT_FALSE(m_gui->keyPressed(juce::KeyPress(juce::KeyPress::leftKey))) << sheet->getName();
+        EXPECT_FALSE(table("Change").keyPressed(juce::KeyPress(juce::KeyPress::deleteKey)));
+        EXPECT_FALSE(table("Change").keyPressed(juce::KeyPress('a', juce::ModifierKeys::commandModifier, 0)));
+        sheet->setVisible(false);
+    }
+
+    EXPECT_TRUE(button("m_videoRightToggle").getToggleState());
+    EXPECT_EQ(list(ListKind::Change).size(), 3U);
+    EXPECT_EQ(selected("Change"), "1");
 }
 
 TEST_F(MainGuiKeyboardTest, GoesToTheTableAfterASheetThatCameUpWhileAnotherWindowHadIt)

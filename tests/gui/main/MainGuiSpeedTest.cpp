@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
 #include "tests/gui/main/ShownWindow.h"
+#include "tests/support/BestSeconds.h"
 #include "tests/support/Sanitizer.h"
-#include "tests/support/SecondsOf.h"
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <functional>
 #include <iostream>
 #include <memory>
@@ -53,16 +52,12 @@ protected:
         return events;
     }
 
-    /// The best of some runs counts, as the machine has other work.
     static void expectFast(const char* step, const std::function<void()>& prepare, const std::function<void()>& action)
     {
-        double best = 1e9;
-        for (int run = 0; run < 5; ++run) {
-            prepare();
-            best = std::min(best, secondsOf(action));
-        }
+        constexpr double Limit = CADREL_ADDRESS_SANITIZER ? 2.0 : 0.1;
+        const double best = bestSecondsOf(5, Limit, action, prepare);
         std::cout << step << ": " << best * 1000.0 << " ms\n";
-        EXPECT_LT(best, CADREL_ADDRESS_SANITIZER ? 2.0 : 0.1) << step;
+        EXPECT_LT(best, Limit) << step;
     }
 };
 

@@ -607,6 +607,36 @@ TEST_F(MainGuiTest, GeneratesTheChangeEdlWithNothingSelected)
     EXPECT_EQ(m_alerts.messages, Texts());
 }
 
+TEST_F(MainGuiTest, MarksGenerateWhenTheSettingsWouldGiveAnotherListNow)
+{
+    showThree();
+    const juce::String purpose = "Generate Change EDL";
+    const auto hasDot = [this] {
+        const juce::Button& generate = button("Generate Button");
+        const juce::Image shown = m_gui->createComponentSnapshot(generate.getBounds());
+        return shown.getPixelAt(generate.getWidth() - 7, 7) == gui::toColour(gui::Palette::orange);
+    };
+    click("Generate Button");
+    EXPECT_EQ(button("Generate Button").getTooltip(), purpose);
+    EXPECT_FALSE(hasDot());
+
+    m_model.settings().setHealMode(core::HealMode::None);
+    EXPECT_EQ(button("Generate Button").getTooltip(),
+              "The settings have changed since the Change EDL was generated. Press to generate it anew.");
+    EXPECT_TRUE(hasDot());
+    click("Generate Button");
+    EXPECT_EQ(button("Generate Button").getTooltip(), purpose);
+    EXPECT_FALSE(hasDot());
+
+    // The names of VFX shots count when the sheet closes.
+    click("Settings Button");
+    m_model.settings().setVfxPattern({"VFX_", "_v", true}, 0);
+    m_window.press(juce::KeyPress::escapeKey);
+    EXPECT_TRUE(hasDot());
+    list(ListKind::Change).clear();
+    EXPECT_FALSE(hasDot());
+}
+
 TEST_F(MainGuiTest, TellsThatNothingWasFound)
 {
     showThree();
@@ -777,14 +807,20 @@ TEST_F(MainGuiTest, AsksBeforeItOverwritesNumberedFiles)
     activate();
     folder.write("change_1.edl", "old");
     m_box.chosen = {(folder / "change.edl").string()};
-    m_alerts.answer = 2;
+    m_alerts.answer = 3;
     click("Save Change Edl Button");
 
     EXPECT_EQ(m_alerts.messages.size(), 1U);
     EXPECT_EQ(m_alerts.buttons.at(0), (Texts{L"Overwrite", L"Cancel"}));
     EXPECT_EQ(contentOf(folder / "change_1.edl"), "old");
     EXPECT_EQ(folder.names(), std::vector<std::string>{"change_1.edl"});
-    m_alerts.answer = 1;
+    for (const auto key : {RecordingAlerts::Key::Return, RecordingAlerts::Key::Escape}) {
+        m_alerts.key = key;
+        click("Save Change Edl Button");
+        EXPECT_EQ(contentOf(folder / "change_1.edl"), "old");
+    }
+    m_alerts.key.reset();
+    m_alerts.answer = 2;
     click("Save Change Edl Button");
     EXPECT_NE(contentOf(folder / "change_1.edl"), "old");
 }
@@ -1412,10 +1448,10 @@ TEST_F(MainGuiProtectionTest, PutsAListThatKeepsAllInThePlaceOfAGeneratedOne)
     click("Cadrel Button");
 
     ASSERT_EQ(m_alerts.messages.size(), 1U);
-    EXPECT_EQ(m_engine.calls, Calls{"run 3608..3620"});
-    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
-    ASSERT_EQ(list(ListKind::Change).size(), 1U);
-    EXPECT_EQ(list(ListKind::Change).at(0).rollName(), "B002");
+    EXPECT_EQ(m_engine.calls, Calls{"run 3608..3620 of B002"});
+    // The list changes with the run, so that both are one entry of the undo list.
+    EXPECT_EQ(m_undo.begun, Texts());
+    EXPECT_EQ(list(ListKind::Change).size(), 2U);
 }
 
 TEST_F(MainGuiProtectionTest, LeavesAGeneratedListAsItIsWhenTheRunIsRefused)
@@ -1430,16 +1466,28 @@ TEST_F(MainGuiProtectionTest, LeavesAGeneratedListAsItIsWhenTheRunIsRefused)
     EXPECT_TRUE(m_gui->isEnabled());
 }
 
-TEST_F(MainGuiProtectionTest, DropsTheRunWhoseListCannotBeMade)
+TEST_F(MainGuiProtectionTest, KeepsOnReturnAndStartsNoRunOnEscape)
 {
     showGenerated();
-    m_undo.failure = Result::HostCallFailed;
+    m_alerts.key = RecordingAlerts::Key::Escape;
     click("Cadrel Button");
+    EXPECT_EQ(m_engine.calls, Calls());
+    m_alerts.key = RecordingAlerts::Key::Return;
+    click("Cadrel Button");
+    EXPECT_EQ(m_engine.calls, Calls{"run 3608..3620 of B002"});
+}
 
-    EXPECT_EQ(list(ListKind::Change).size(), 2U);
-    EXPECT_EQ(m_engine.calls, (Calls{"run 3608..3620", "off"}));
-    EXPECT_EQ(m_alerts.messages.back(), L"The workstation has refused this. Check that no track is locked.");
-    EXPECT_TRUE(m_gui->isEnabled());
+TEST_F(MainGuiProtectionTest, StartsNoRunOnReturnOrEscapeWhereNothingCanBeKept)
+{
+    showLateReel();
+    addSoundAtMidnight();
+    for (const auto key : {RecordingAlerts::Key::Return, RecordingAlerts::Key::Escape}) {
+        m_alerts.key = key;
+        click("Cadrel Button");
+    }
+
+    EXPECT_EQ(m_alerts.messages.size(), 2U);
+    EXPECT_EQ(m_engine.calls, Calls());
 }
 
 TEST_F(MainGuiProtectionTest, AsksAgainWhenThereIsMoreToKeepAfterTheQuestion)
@@ -1472,8 +1520,7 @@ TEST_F(MainGuiProtectionTest, AsksAgainWhenNothingCanBeKeptAfterTheQuestion)
 
     ASSERT_EQ(m_alerts.messages.size(), 2U);
     EXPECT_NE(m_alerts.messages[1].find(L"It can't be kept"), std::wstring::npos);
-    // The first button of the second question is the one that changes nothing.
-    EXPECT_EQ(m_alerts.buttons[1], (Texts{L"Cancel", L"Don't Keep"}));
+    EXPECT_EQ(m_alerts.buttons[1], (Texts{L"Don't Keep", L"Cancel"}));
     EXPECT_EQ(m_engine.calls, Calls());
     EXPECT_EQ(list(ListKind::Change).size(), 1U);
 }
@@ -1486,7 +1533,7 @@ TEST_F(MainGuiProtectionTest, AsksWhetherToRepeatARunThatHasBeenDoneDuringTheQue
 
     ASSERT_EQ(m_alerts.messages.size(), 2U);
     EXPECT_EQ(m_alerts.messages[1].substr(0, 61), L"This Change EDL has been carried out in the project already.\n");
-    // The first button of the second question is the one that changes nothing.
+    // No button is the first one of the second question.
     EXPECT_EQ(m_engine.calls, Calls());
 }
 
@@ -1501,10 +1548,9 @@ TEST_F(MainGuiProtectionTest, EndsAPreviewThatHasComeOnDuringTheQuestion)
     click("Cadrel Button");
 
     // Else the change of the list would end it, and drop the run.
-    EXPECT_EQ(m_engine.calls, (Calls{"off", "run 3608..3620"}));
+    EXPECT_EQ(m_engine.calls, (Calls{"off", "run 3608..3620 of B002"}));
     EXPECT_FALSE(m_model.isPreviewActive());
     EXPECT_TRUE(source().getToggleState());
-    EXPECT_EQ(m_undo.entries, Texts{L"Keep Sound outside of the Change EDL"});
     EXPECT_FALSE(m_gui->isEnabled());
 }
 
@@ -1526,7 +1572,7 @@ TEST_F(MainGuiProtectionTest, OffersToLeaveItWhereNothingCanBeKept)
     m_alerts.answer = 2;
     click("Cadrel Button");
 
-    EXPECT_EQ(m_alerts.buttons.at(0), (Texts{L"Cancel", L"Don't Keep"}));
+    EXPECT_EQ(m_alerts.buttons.at(0), (Texts{L"Don't Keep", L"Cancel"}));
     EXPECT_EQ(m_engine.calls, Calls{"run"});
 }
 
@@ -1581,7 +1627,7 @@ TEST_F(MainGuiRepeatTest, StartsTheSameRunAgainOnlyWhenTheUserWantsThat)
 
     ASSERT_EQ(m_alerts.messages.size(), 1U);
     EXPECT_EQ(m_alerts.messages[0].substr(0, 61), L"This Change EDL has been carried out in the project already.\n");
-    EXPECT_EQ(m_alerts.buttons[0], (Texts{L"Cancel", L"Start Anyway"}));
+    EXPECT_EQ(m_alerts.buttons[0], (Texts{L"Start Anyway", L"Cancel"}));
     EXPECT_EQ(m_engine.calls, Calls());
     EXPECT_TRUE(m_gui->isEnabled());
     m_alerts.answer = 2;
@@ -1596,6 +1642,27 @@ TEST_F(MainGuiRepeatTest, StartsNoRunWhenTheUserClosesTheQuestion)
         click("Cadrel Button");
     }
 
+    EXPECT_EQ(m_engine.calls, Calls());
+}
+
+TEST_F(MainGuiRepeatTest, StartsNoRunOnReturnOrEscape)
+{
+    for (const auto key : {RecordingAlerts::Key::Return, RecordingAlerts::Key::Escape}) {
+        m_alerts.key = key;
+        click("Cadrel Button");
+    }
+    EXPECT_EQ(m_alerts.messages.size(), 2U);
+
+    // The sound stands in the cut of a shot that isn't the one of the old cut now.
+    list(ListKind::Old).add(makeEvent("A001", "10:00:00:00", "10:00:15:00", "01:00:00:00", "01:00:15:00"));
+    list(ListKind::New).add(makeEvent("B002", "10:00:00:00", "10:00:15:00", "01:00:00:00", "01:00:15:00"));
+    core::RunRecord::addRun(m_model, core::PastRuns::AllTime);
+    for (const auto key : {RecordingAlerts::Key::Return, RecordingAlerts::Key::Escape}) {
+        m_alerts.key = key;
+        click("Cadrel Button");
+        EXPECT_EQ(m_alerts.messages.back().substr(0, 46), L"The Old EDL isn't the cut of the last run. The");
+    }
+    EXPECT_EQ(m_alerts.messages.size(), 4U);
     EXPECT_EQ(m_engine.calls, Calls());
 }
 

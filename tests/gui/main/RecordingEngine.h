@@ -35,12 +35,14 @@ public:
     util::Result::Type canStart() override { return ready; }
     util::Result::Type startCadrel() override { return note("run"); }
     /// "run 3600..3610", in whole seconds.
-    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds) override
+    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds) override { return note(textOf(bounds)); }
+    /// "run 3600..3610 of B002", with the rolls of the list.
+    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds, const core::EventList& changeList) override
     {
-        return note(std::string("run ")
-                        .append(std::to_string(static_cast<long>(bounds.start)))
-                        .append("..")
-                        .append(std::to_string(static_cast<long>(bounds.end))));
+        std::string rolls;
+        for (const auto& event : changeList.events())
+            rolls.append(rolls.empty() ? "" : "+").append(event->rollName());
+        return note(textOf(bounds).append(" of ").append(rolls));
     }
     std::vector<core::SecondsRange> getMaterial() override { return material; }
     /// "preview 1+2+3 1 1 0": the numbers of the events, the neighbours on both sides and the options.
@@ -73,6 +75,13 @@ public:
     }
 
 private:
+    static std::string textOf(const core::SecondsRange& bounds)
+    {
+        return std::string("run ")
+            .append(std::to_string(static_cast<long>(bounds.start)))
+            .append("..")
+            .append(std::to_string(static_cast<long>(bounds.end)));
+    }
     static std::string textOf(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                               std::uint32_t options)
     {

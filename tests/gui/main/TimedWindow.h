@@ -5,13 +5,11 @@
 #include "core/edl/EventBase.h"
 #include "core/serialize/ByteArchive.h"
 #include "tests/gui/main/ShownWindow.h"
+#include "tests/support/BestSeconds.h"
 #include "tests/support/Sanitizer.h"
-#include "tests/support/SecondsOf.h"
 
-#include <algorithm>
 #include <functional>
 #include <iostream>
-#include <limits>
 #include <memory>
 #include <string>
 #include <vector>
@@ -30,26 +28,26 @@ protected:
     // As the host's undo list does.
     TimedWindow() { m_undo.model = &m_model; }
 
+    static double boundOf(double limit) { return CADREL_ADDRESS_SANITIZER ? 20.0 * limit : limit; }
     static void expectBelow(double limit, double seconds, const std::string& step)
     {
         std::cout << step << ": " << seconds * 1000.0 << " ms\n";
-        EXPECT_LT(seconds, CADREL_ADDRESS_SANITIZER ? 20.0 * limit : limit) << step;
+        EXPECT_LT(seconds, boundOf(limit)) << step;
     }
-    /// The best of some runs counts, as the machine has other work. What is prepared doesn't count.
+    /// The best of some runs counts. What is prepared doesn't count.
     static void expectFast(
         const std::string& step, double limit, const std::function<void()>& action,
         const std::function<void()>& prepare = [] {})
     {
-        double best = std::numeric_limits<double>::max();
-        for (int run = 0; run < Runs; ++run) {
+        const auto act = [&] {
+            action();
+            FocusedWindow::pump();
+        };
+        const auto getReady = [&] {
             prepare();
             FocusedWindow::pump();
-            best = std::min(best, secondsOf([&] {
-                                action();
-                                FocusedWindow::pump();
-                            }));
-        }
-        expectBelow(limit, best, step);
+        };
+        expectBelow(limit, bestSecondsOf(Runs, boundOf(limit), act, getReady), step);
     }
 
     /// Two shots that take turns, 20 frames each, which touch.

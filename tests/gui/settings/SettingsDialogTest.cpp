@@ -477,6 +477,22 @@ TEST_F(SettingsDialogTest, LeavesAStoredNameThatDoesNotCompileAsItIs)
     EXPECT_EQ(m_settings.vfxPattern(0).prefix, "caf\xe9\n/");
 }
 
+TEST_F(SettingsDialogTest, DimsTheNamesOfARowWithoutATick)
+{
+    m_settings.setVfxPattern(VfxPatternEntry("A", "_v", true), 0);
+    m_settings.setVfxPattern(VfxPatternEntry("B", "_v", false), 1);
+    open();
+
+    EXPECT_EQ(editor(Prefix1).getAlpha(), 1.0F);
+    EXPECT_LT(editor("vfxShotHandlingPrefix2").getAlpha(), 1.0F);
+    EXPECT_LT(editor("vfxShotHandlingPostfix2").getAlpha(), 1.0F);
+    EXPECT_EQ(editor("vfxShotHandlingPrefix2").getTooltip(), "Tick the row to use this name.");
+    m_window.click(toggle("vfxShotHandlingSelect2"));
+    EXPECT_EQ(editor("vfxShotHandlingPrefix2").getAlpha(), 1.0F);
+    EXPECT_EQ(editor("vfxShotHandlingPrefix2").getTooltip(), "* stands for any one character");
+    EXPECT_LT(editor("vfxShotHandlingPrefix3").getAlpha(), 1.0F);
+}
+
 TEST_F(SettingsDialogTest, TellsNoMoreOfANameThatIsMendedOrNotUsed)
 {
     m_settings.setVfxPattern(VfxPatternEntry("A/B", "_v", true), 0);

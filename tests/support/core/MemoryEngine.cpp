@@ -108,7 +108,9 @@ Result::Type MemoryEngine::onIdle()
 
 Result::Type MemoryEngine::carryOutRun()
 {
-    const core::EventList& changeList = m_model.changeEdl();
+    core::EventList& changeList = m_model.changeEdl();
+    if (const auto ownList = std::exchange(m_runList, std::nullopt))
+        changeList = *ownList;
     const ShownProgress shown(m_progress, m_shownProgress, L"Processing Project",
                               estimateSteps(changeList.size(), m_model.settings(), candidates().size()), true);
     std::optional<core::RestrictedRange> restricted;
@@ -138,6 +140,7 @@ Result::Type MemoryEngine::startCadrel()
     if (result == Result::Ok) {
         m_isRunRequested = true;
         m_runBounds.reset();
+        m_runList.reset();
     }
     return result;
 }
@@ -147,6 +150,14 @@ Result::Type MemoryEngine::startCadrelWithin(const core::SecondsRange& bounds)
     const Result::Type result = startCadrel();
     if (result == Result::Ok)
         m_runBounds = bounds;
+    return result;
+}
+
+Result::Type MemoryEngine::startCadrelWithin(const core::SecondsRange& bounds, const core::EventList& changeList)
+{
+    const Result::Type result = startCadrelWithin(bounds);
+    if (result == Result::Ok)
+        m_runList.emplace(changeList);
     return result;
 }
 

@@ -63,6 +63,7 @@ public:
 
     util::Result::Type startCadrel() override;
     util::Result::Type startCadrelWithin(const core::SecondsRange& bounds) override;
+    util::Result::Type startCadrelWithin(const core::SecondsRange& bounds, const core::EventList& changeList) override;
     std::vector<core::SecondsRange> getMaterial() override;
     util::Result::Type startPreview(const core::EventList& events, std::uint64_t first, std::uint64_t last,
                                     std::uint32_t options) override;
@@ -124,6 +125,7 @@ private:
     std::optional<double> m_stretchStart;
     bool m_isRunRequested = false;
     std::optional<core::SecondsRange> m_runBounds;
+    std::optional<core::EventList> m_runList;
     std::optional<PreviewRequest> m_requestedPreview;
     core::EventList m_projectEvents;
     Transport m_transport;

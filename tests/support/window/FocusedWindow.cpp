@@ -17,6 +17,8 @@ class ScreenlessPeer : public juce::ComponentPeer {
 public:
     using ComponentPeer::ComponentPeer;
 
+    bool hasKeyboard = true;
+
     /// Of no window; JUCE only takes it for one.
     void* getNativeHandle() const override { return const_cast<ScreenlessPeer*>(this); }
     void setVisible(bool) override {}
@@ -46,7 +48,7 @@ public:
     bool setAlwaysOnTop(bool) override { return true; }
     void toFront(bool) override {}
     void toBehind(ComponentPeer*) override {}
-    bool isFocused() const override { return true; }
+    bool isFocused() const override { return hasKeyboard; }
     void grabFocus() override {}
     void repaint(const juce::Rectangle<int>&) override {}
     void performAnyPendingRepaintsNow() override {}
@@ -77,6 +79,18 @@ FocusedWindow::~FocusedWindow()
 juce::ComponentPeer* FocusedWindow::createNewPeer(int styleFlags, void*)
 {
     return new ScreenlessPeer(*this, styleFlags);
+}
+
+void FocusedWindow::loseKeyboard()
+{
+    dynamic_cast<ScreenlessPeer&>(*getPeer()).hasKeyboard = false;
+    getPeer()->handleFocusLoss();
+}
+
+void FocusedWindow::regainKeyboard()
+{
+    dynamic_cast<ScreenlessPeer&>(*getPeer()).hasKeyboard = true;
+    getPeer()->handleFocusGain();
 }
 
 bool FocusedWindow::press(int keyCode, juce::ModifierKeys modifiers)

@@ -15,6 +15,10 @@ public:
     FocusedWindow(int width, int height);
     ~FocusedWindow() override;
 
+    /// As another window of the host gets the keyboard, and as this one gets it back.
+    void loseKeyboard();
+    void regainKeyboard();
+
     /// False when no component has used the key.
     bool press(int keyCode, juce::ModifierKeys modifiers = {});
     /// Presses the keys of the characters, one by one.

@@ -4,8 +4,12 @@
 
 #include "gui/services/AlertWindowBase.h"
 
+#include <array>
+#include <cstddef>
+#include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -13,7 +17,7 @@
 namespace cadrel::tests {
 
 /// The alerts of the process while it lives. Writes down what the user is told, and answers with the first button or as a
-/// test says.
+/// test says, by button or by key.
 class RecordingAlerts {
 public:
     RecordingAlerts() { gui::AlertWindowBase::install(std::make_unique<Alerts>(*this)); }
@@ -24,7 +28,9 @@ public:
     std::vector<std::wstring> messages;
     std::vector<std::vector<std::wstring>> buttons; ///< of each message, without the empty texts
     std::int32_t answer = 1;                        ///< the button that is pressed, counted from 1
-    std::function<void()> meanwhile;                ///< called once, while the next alert is open
+    enum class Key { Return, Escape };
+    std::optional<Key> key;          ///< pressed instead of a button, when it is set
+    std::function<void()> meanwhile; ///< called once, while the next alert is open
 
 private:
     class Alerts : public gui::AlertWindowBase {
@@ -42,10 +48,19 @@ private:
             }
             if (const auto call = std::exchange(m_owner.meanwhile, nullptr))
                 call();
-            return m_owner.answer;
+            return m_owner.key ? buttonOf(*m_owner.key, {&button1, &button2, &button3}) : m_owner.answer;
         }
 
     private:
+        /// Return uses the first button, and the last one where the first is left out; Escape the last one.
+        static std::int32_t buttonOf(Key key, const std::array<const std::wstring*, 3>& texts)
+        {
+            std::int32_t last = 1;
+            for (std::size_t index = 0; index < texts.size(); ++index)
+                last = texts.at(index)->empty() ? last : static_cast<std::int32_t>(index) + 1;
+            return key == Key::Return && !texts.front()->empty() ? 1 : last;
+        }
+
         RecordingAlerts& m_owner;
     };
 };
