@@ -56,7 +56,16 @@ FileBox::FileBox(const standin::UserBoxes::FileQuestion& question, const std::fi
     addAndMakeVisible(m_accept);
     addAndMakeVisible(m_cancel);
     setPanelSize(Width, Height);
+    propose(toJuce(question.name));
     selectionChanged();
+}
+
+/// The part that the user will change is selected.
+void FileBox::propose(const juce::String& name)
+{
+    const int dot = name.lastIndexOfChar('.');
+    m_name->setText(name, false);
+    m_name->setHighlightedRegion({0, dot > 0 ? dot : name.length()});
 }
 
 void FileBox::setColours()

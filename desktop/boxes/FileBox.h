@@ -44,6 +44,7 @@ private:
 
     void findParts();
     void setColours();
+    void propose(const juce::String& name);
     juce::File named() const;
     void accept();
     void open();

@@ -16,9 +16,27 @@ namespace {
 /// Nothing changes for so many times what a comparison costs before one is made.
 constexpr int QuietCosts = 20;
 
+/// While it lives, the playhead of a project stands elsewhere. Nobody is told.
+class PlayheadAt {
+public:
+    PlayheadAt(standin::Project& project, double place)
+        : m_position(project.position()), m_former(m_position.getValue())
+    {
+        m_position.setValue(0, place);
+    }
+    PlayheadAt(const PlayheadAt&) = delete;
+    PlayheadAt& operator=(const PlayheadAt&) = delete;
+    ~PlayheadAt() { m_position.setValue(0, m_former); }
+
+private:
+    standin::Parameter& m_position;
+    double m_former;
+};
+
 } // namespace
 
-UnsavedMark::UnsavedMark(standin::Project& project) : m_project(project)
+UnsavedMark::UnsavedMark(standin::Project& project)
+    : m_project(project), m_storedPlayhead(project.position().getValue())
 {
     announce();
     m_at = positionNow();
@@ -33,7 +51,7 @@ UnsavedMark::UnsavedMark(standin::Project& project) : m_project(project)
 }
 
 UnsavedMark::UnsavedMark(standin::Project& project, const ContentPrint& stored)
-    : m_project(project), m_stored(stored), m_isSet(true)
+    : m_project(project), m_stored(stored), m_storedPlayhead(project.position().getValue()), m_isSet(true)
 {
     announce();
     m_at = positionNow();
@@ -100,7 +118,8 @@ std::string UnsavedMark::textHere()
 {
     const auto start = Clock::now();
     std::string text = ProjectFile::toText(m_project);
-    const ContentPrint print = ContentPrint::of(text);
+    const bool isAtStored = m_project.position().getValue() == m_storedPlayhead;
+    const ContentPrint print = ContentPrint::of(isAtStored ? text : textWithStoredPlayhead());
     m_cost = Clock::now() - start;
     m_isExact = true;
     m_isSet = print != m_stored;
@@ -109,10 +128,17 @@ std::string UnsavedMark::textHere()
     return text;
 }
 
+std::string UnsavedMark::textWithStoredPlayhead()
+{
+    const PlayheadAt stored(m_project, m_storedPlayhead);
+    return ProjectFile::toText(m_project);
+}
+
 void UnsavedMark::wasStored(const ContentPrint& print)
 {
     m_canAnnounce = true;
     m_stored = print;
+    m_storedPlayhead = m_project.position().getValue();
     advance();
     m_storedAt = m_at;
     m_isSet = false;
@@ -128,6 +154,7 @@ void UnsavedMark::announce()
 
 std::uint64_t UnsavedMark::headOf() const
 try {
+    const PlayheadAt stored(m_project, m_storedPlayhead);
     return ContentPrint::of(standin::ProjectWriter::textOf(m_project, [](const standin::Node&) { return false; })).hash;
 } catch (const standin::FileFault& fault) {
     return ContentPrint::of(fault.what()).hash;

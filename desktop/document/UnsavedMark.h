@@ -15,7 +15,7 @@ class Project;
 
 namespace desktop {
 
-/// Knows whether a project would be stored with other bytes than it is.
+/// Knows whether a project would be stored with other bytes than it is. Where the playhead stands is no work: it doesn't count.
 ///
 /// To write these bytes for each question would take too long. The undo list tells where it stands, the project counts the
 /// changes that no undo takes back, and what else is stored stands in the project's own values, which are few. As long as
@@ -67,9 +67,12 @@ private:
     void advance();
     void compare();
     std::string textHere();
+    /// The text with the playhead where it was when the project was stored.
+    std::string textWithStoredPlayhead();
 
     standin::Project& m_project;
     ContentPrint m_stored;
+    double m_storedPlayhead;            ///< in seconds of the project
     std::optional<Position> m_storedAt; ///< nothing where no position is known to have the stored bytes
     Position m_at;                      ///< where it was when it was last looked at
     bool m_isSet = false;               ///< there

@@ -3,6 +3,7 @@
 #include "desktop/shell/DesktopProgram.h"
 
 #include "desktop/document/DroppedFile.h"
+#include "desktop/shell/KeyTable.h"
 #include "standin/edit/ActionManager.h"
 #include "standin/window/ViewManager.h"
 #include "velmark/UserInterface.h"
@@ -67,6 +68,8 @@ DesktopProgram::~DesktopProgram()
 
 void DesktopProgram::loadModule(const ModulePlaces& places)
 {
+    if (const std::string fault = places.resourcesFault(); !fault.empty())
+        later([this, fault] { m_workspace.tell(fault); });
     try {
         m_module.emplace(m_application, places.module, places.resources);
     } catch (const standin::ModuleError& error) {
@@ -103,6 +106,7 @@ void DesktopProgram::idle(bool isWaiting)
     }
     refresh();
     refreshTracks();
+    m_window.view().keepKeyboard();
 }
 
 void DesktopProgram::endIfAsked(bool isHostIdle)
@@ -171,8 +175,10 @@ void DesktopProgram::chooseOfList(int command)
     const auto indexFrom = [command](int first) { return static_cast<std::size_t>(command - first); };
     if (command < MenuCommand::FirstOfModules)
         return openRecent(indexFrom(MenuCommand::FirstRecent));
-    if (command < MenuCommand::FirstHistory)
-        return chooseModuleCommand(indexFrom(MenuCommand::FirstOfModules));
+    if (command < MenuCommand::FirstHistory) {
+        chooseModuleCommand(indexFrom(MenuCommand::FirstOfModules));
+        return m_window.view().embedded().takeKeyboard();
+    }
     if (OpenDocument* const active = m_documents.active())
         active->goToUndoPosition(indexFrom(MenuCommand::FirstHistory));
 }
@@ -239,19 +245,7 @@ void DesktopProgram::showModuleWindow()
 
 void DesktopProgram::showKeys()
 {
-    m_workspace.tell("Ctrl+O  opens a project\n"
-                     "Ctrl+S, Ctrl+Shift+S  saves it, and saves it as another file\n"
-                     "Ctrl+Z, Ctrl+Shift+Z  undo and redo\n"
-                     "Ctrl+W, Ctrl+Q  closes the project, and the program\n"
-                     "F10  opens the menus\n\n"
-                     "F  shows all of the programme\n"
-                     "P  goes to the preview and back\n"
-                     "G  shows where the clips stood before\n"
-                     "Ctrl with the wheel, + and -  zoom in and out\n"
-                     "Shift with the wheel, Left and Right  scroll left and right\n"
-                     "Home, End  go to the beginning and the end of the programme\n"
-                     "Page Up, Page Down  scroll the tracks\n"
-                     "Alt with the wheel  makes the tracks higher and lower");
+    m_workspace.tell(keyTableText());
 }
 
 void DesktopProgram::showAbout()

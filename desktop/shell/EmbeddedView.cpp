@@ -153,6 +153,17 @@ void EmbeddedView::setCovered(bool isCovered)
     repaint();
 }
 
+bool EmbeddedView::hasKeyboard() const
+{
+    return m_window && m_window->container().hasKeyboard();
+}
+
+void EmbeddedView::takeKeyboard()
+{
+    if (m_window && m_window->isShown() && !m_isCovered)
+        m_window->listener().focusChanged(true);
+}
+
 juce::Image EmbeddedView::takePicture()
 {
     const auto picture = m_window->container().picture();
@@ -164,7 +175,7 @@ juce::Image EmbeddedView::takePicture()
 
 void EmbeddedView::giveKeyboardAway()
 {
-    if (m_window && m_window->container().hasKeyboard())
+    if (hasKeyboard())
         m_window->container().giveKeyboardAway();
 }
 

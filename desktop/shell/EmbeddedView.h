@@ -33,6 +33,10 @@ public:
     /// While it is covered, the module's window is hidden, and a picture of it is shown in its place: nothing of ours could be
     /// seen over it, and it takes no input. Afterwards it has the keyboard again if it had it before.
     void setCovered(bool isCovered);
+    /// Whether the keyboard is in the module's window.
+    bool hasKeyboard() const;
+    /// Gives the keyboard to the module's window, if there is one and it isn't covered.
+    void takeKeyboard();
     /// To our own window, when the keyboard is in the module's.
     void giveKeyboardAway();
 

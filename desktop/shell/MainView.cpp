@@ -173,6 +173,39 @@ void MainView::menuItemSelected(int command, int /*index*/)
         onCommand(command);
 }
 
+void MainView::keepKeyboard()
+{
+    juce::ComponentPeer* const peer = getPeer();
+    const bool isMenuOpen = juce::Component::getNumCurrentlyModalComponents() > 0;
+    if (!m_tracks || !peer || isMenuOpen || juce::Component::getCurrentlyFocusedComponent() || m_embedded.hasKeyboard())
+        return;
+    if (peer->isFocused() || m_screen.hasLostKeyboard(windowOf(peer)))
+        m_tracks->grabKeyboardFocus();
+}
+
+void MainView::moveKeyboard()
+{
+    if (!m_embedded.hasKeyboard())
+        return m_embedded.takeKeyboard();
+    m_embedded.giveKeyboardAway();
+    if (m_tracks)
+        m_tracks->grabKeyboardFocus();
+}
+
+bool MainView::moveByKey(const juce::KeyPress& key)
+{
+    if (key == juce::KeyPress(juce::KeyPress::F6Key)) {
+        moveKeyboard();
+        return true;
+    }
+    const juce::ModifierKeys modifiers = key.getModifiers();
+    if (!key.isKeyCode(juce::KeyPress::tabKey) || !modifiers.isCtrlDown() || modifiers.isAltDown())
+        return false;
+    if (const auto tab = m_tabs.tabAfter(modifiers.isShiftDown() ? -1 : 1); tab && onTabChosen)
+        onTabChosen(*tab);
+    return true;
+}
+
 bool MainView::keyPressed(const juce::KeyPress& key, juce::Component* /*origin*/)
 {
     if (isBlocked && isBlocked())
@@ -183,6 +216,8 @@ bool MainView::keyPressed(const juce::KeyPress& key, juce::Component* /*origin*/
         m_menuBar.showMenu(0);
         return true;
     }
+    if (moveByKey(key))
+        return true;
     const int command = commandOfKey(key);
     if (command == 0 || !onCommand)
         return false;

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "desktop/shell/EmbeddedView.h"
+#include "desktop/shell/ManagedScreen.h"
 #include "desktop/shell/MenuBarLook.h"
 #include "desktop/shell/Menus.h"
 #include "desktop/shell/TabStrip.h"
@@ -48,6 +49,8 @@ public:
     /// All but the boxes.
     juce::Component& desk() { return m_desk; }
 
+    /// Gives the keyboard to the tracks where the program has it, but nothing in it, as after a menu or a box.
+    void keepKeyboard();
     /// Takes the keys that nothing else in the window uses.
     void listenToKeysOf(juce::Component& window) { window.addKeyListener(this); }
     void stopListeningTo(juce::Component& window) { window.removeKeyListener(this); }
@@ -66,6 +69,9 @@ private:
     void menuItemSelected(int command, int index) override;
     using juce::Component::keyPressed;
     bool keyPressed(const juce::KeyPress& key, juce::Component* origin) override;
+    /// Keys that need no command of the menus.
+    bool moveByKey(const juce::KeyPress& key);
+    void moveKeyboard();
     void layOut();
 
     juce::SharedResourcePointer<cadrel::gui::LookAndFeel> m_look;
@@ -75,6 +81,7 @@ private:
     TabStrip m_tabs;
     std::unique_ptr<Divider> m_divider;
     EmbeddedView m_embedded;
+    ManagedScreen m_screen;
     juce::Component* m_tracks = nullptr;
     int m_wantedTracks = -1;
 };

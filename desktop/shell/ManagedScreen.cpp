@@ -91,6 +91,20 @@ ManagedScreen::Extent ManagedScreen::extentOf(Window window) const
     return isWide ? Extent::Maximised : Extent::Own;
 }
 
+bool ManagedScreen::hasLostKeyboard(Window window) const
+{
+    Display* const display = m_connection.display();
+    if (!display)
+        return false;
+    Window focused = 0;
+    int revert = 0;
+    XGetInputFocus(display, &focused, &revert);
+    const auto root = DefaultRootWindow(display);
+    if (focused != None && focused != PointerRoot && focused != root)
+        return false;
+    return !hasManager() || numbersOf(display, root, "_NET_ACTIVE_WINDOW", XA_WINDOW) == std::vector{window};
+}
+
 void ManagedScreen::startMaximised(Window window) const
 {
     Display* const display = m_connection.display();

@@ -32,6 +32,8 @@ public:
     /// The part of the present desktop that no panels take. Nothing where that isn't told.
     std::optional<Area> workArea() const;
     Extent extentOf(Window window) const;
+    /// Whether no window has the keyboard, although this one is the active one. Without a window manager every window is.
+    bool hasLostKeyboard(Window window) const;
     /// Has a window come up maximised that isn't on the screen yet.
     void startMaximised(Window window) const;
 

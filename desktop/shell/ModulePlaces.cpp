@@ -12,6 +12,16 @@ ModulePlaces ModulePlaces::besideProgram(const std::filesystem::path& program)
     return {top / "lib" / "Cadrel.so", top / "resources"};
 }
 
+std::string ModulePlaces::resourcesFault() const
+{
+    std::error_code error;
+    if (std::filesystem::is_directory(resources, error))
+        return {};
+    return std::string("Cadrel's window can't be shown, because its folder ")
+        .append(resources.string())
+        .append(" is missing. Install Cadrel again, or put the folder there.");
+}
+
 std::filesystem::path runningProgram()
 {
     std::error_code ignored;

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <filesystem>
+#include <string>
 
 namespace desktop {
 
@@ -13,6 +14,8 @@ struct ModulePlaces {
     std::filesystem::path resources;
 
     static ModulePlaces besideProgram(const std::filesystem::path& program);
+    /// Tells the user why Cadrel's window can't be shown with what is there; empty where it can.
+    std::string resourcesFault() const;
 };
 
 /// The file of the running program.

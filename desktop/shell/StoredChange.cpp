@@ -6,6 +6,7 @@
 #include "core/model/ListOfKind.h"
 #include "core/protect/RunRecord.h"
 #include "core/serialize/ByteArchive.h"
+#include "core/settings/Settings.h"
 #include "core/time/FramerateProvider.h"
 #include "core/time/Timecode.h"
 #include "desktop/tracks/ProjectClock.h"
@@ -77,6 +78,14 @@ ChangeMap::State stateOf(const core::DataModel& model)
     return isDone ? ChangeMap::State::Carried : ChangeMap::State::Planned;
 }
 
+/// By what pictures are compared; names with versions are different ones where a row of the settings can't be used.
+core::PictureNames namesOf(const core::Settings& settings)
+try {
+    return {settings.matchBy(), settings.vfxPatterns()};
+} catch (Result::Type) {
+    return {settings.matchBy(), {}};
+}
+
 /// The rows of the table are in its order.
 std::optional<std::size_t> selectedEvent(core::DataModel& model)
 {
@@ -117,7 +126,7 @@ bool StoredChange::look(const standin::Project& project)
         core::DataModel model;
         block >> model;
         m_map = ChangeMap(model.changeEdl(), model.oldEdl(), model.newEdl(), clock.framerate(), project.timeOrigin(),
-                          stateOf(model));
+                          stateOf(model), namesOf(model.settings()));
         m_event = selectedEvent(model);
         return true;
     } catch (Result::Type) {

@@ -31,6 +31,15 @@ void TabStrip::setTabs(std::vector<Tab> tabs, std::size_t active)
     repaint();
 }
 
+std::optional<std::uint64_t> TabStrip::tabAfter(int steps) const
+{
+    if (m_tabs.empty())
+        return std::nullopt;
+    const int count = static_cast<int>(m_tabs.size());
+    const int index = ((static_cast<int>(m_active) + steps) % count + count) % count;
+    return m_tabs[static_cast<std::size_t>(index)].id;
+}
+
 int TabStrip::tabWidth() const
 {
     const int count = std::max(1, static_cast<int>(m_tabs.size()));

@@ -7,6 +7,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <functional>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -33,6 +34,8 @@ public:
     std::function<void(std::uint64_t)> onClosed;
 
     void setTabs(std::vector<Tab> tabs, std::size_t active);
+    /// The tab so many places after the active one, round and round. Nothing without tabs.
+    std::optional<std::uint64_t> tabAfter(int steps) const;
     /// Of a tab, and of its cross.
     juce::Rectangle<int> tabArea(std::size_t index) const;
     juce::Rectangle<int> crossArea(std::size_t index) const;

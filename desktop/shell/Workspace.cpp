@@ -145,8 +145,9 @@ bool Workspace::settle(OpenDocument& document, const SaveAnswer& answer)
 bool Workspace::saveAs(OpenDocument& document)
 {
     const auto& filter = document.project().form() ? ArdourFilter : StageFilter;
-    const auto files =
-        m_boxes.chooseFiles({u"Save Project As", {filter}, toUtf16(document.path().parent_path().string()), true});
+    const fs::path& path = document.path();
+    const auto files = m_boxes.chooseFiles(
+        {u"Save Project As", {filter}, toUtf16(path.parent_path().string()), true, toUtf16(path.filename().string())});
     return !files.empty() && settled(document, m_documents.saveAs(document, toUtf8(files.front())));
 }
 

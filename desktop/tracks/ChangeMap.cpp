@@ -5,6 +5,8 @@
 #include "core/edl/EventBase.h"
 #include "core/edl/EventList.h"
 #include "core/edl/ProgrammePlace.h"
+#include "core/picture/PictureComparison.h"
+#include "core/picture/PictureLine.h"
 #include "host/track/CoveredRanges.h"
 #include "standin/base/Times.h"
 
@@ -57,6 +59,26 @@ bool hasTimes(const EventBase& event, const Framerate& framerate)
            event.dstOut().isValid(framerate);
 }
 
+/// The picture before `first` and after `last` that is the same at the same time in both cuts.
+std::vector<Span> unchangedOutside(const EventList& oldCut, const EventList& newCut, cadrel::core::PictureNames& names,
+                                   const Framerate& framerate, double origin, double first, double last)
+{
+    const cadrel::core::PictureLine oldLine(oldCut, names, framerate);
+    const cadrel::core::PictureLine newLine(newCut, names, framerate);
+    const cadrel::core::PictureComparison comparison(oldLine, newLine);
+    std::vector<Span> spans;
+    for (const cadrel::core::FrameRange& lit : newLine.lit()) {
+        for (const auto& piece : comparison.equalUnder(0, lit)) {
+            const Span span{piece.frames.start / framerate.rate - origin, piece.frames.end / framerate.rate - origin};
+            if (span.start < first)
+                spans.push_back({span.start, std::min(span.end, first)});
+            if (span.end > last)
+                spans.push_back({std::max(span.start, last), span.end});
+        }
+    }
+    return spans;
+}
+
 double overlapOf(const Span& a, const Span& b)
 {
     return std::min(a.end, b.end) - std::max(a.start, b.start);
@@ -65,7 +87,7 @@ double overlapOf(const Span& a, const Span& b)
 } // namespace
 
 ChangeMap::ChangeMap(const EventList& change, const EventList& oldCut, const EventList& newCut,
-                     const Framerate& framerate, double origin, State state)
+                     const Framerate& framerate, double origin, State state, cadrel::core::PictureNames names)
     : m_state(state)
 {
     for (std::size_t index = 0; index < change.size(); ++index) {
@@ -92,7 +114,14 @@ ChangeMap::ChangeMap(const EventList& change, const EventList& oldCut, const Eve
 
     if (m_state == State::Carried) {
         cadrel::host::CoveredRanges covered;
-        for (const Span& span : present)
+        double first = std::numeric_limits<double>::infinity();
+        double last = -first;
+        for (const Span& span : present) {
+            covered.add({span.start, span.end});
+            first = std::min(first, span.start);
+            last = std::max(last, span.end);
+        }
+        for (const Span& span : unchangedOutside(oldCut, newCut, names, framerate, origin, first, last))
             covered.add({span.start, span.end});
         // Two shots in one dissolve overlap: what is new of both is new once.
         for (const auto& [place, isBlack] : shotsOf(newCut, framerate, origin)) {
@@ -138,12 +167,12 @@ std::optional<ChangeMap::Move> ChangeMap::moveOf(std::size_t event) const
     return found ? std::optional(Move{found->former.start, found->present.start}) : std::nullopt;
 }
 
-std::optional<Span> ChangeMap::placeOf(std::size_t event) const
+std::optional<Span> ChangeMap::placeOf(std::size_t event, State programme) const
 {
     const Stretch* const found = find(event);
     if (!found)
         return std::nullopt;
-    return m_state == State::Carried ? found->present : found->former;
+    return programme == State::Carried ? found->present : found->former;
 }
 
 std::vector<Span> ChangeMap::formerPlaces(const Span& stretch) const

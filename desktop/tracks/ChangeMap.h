@@ -2,6 +2,8 @@
 
 #pragma once
 
+#include "core/picture/PictureNames.h"
+#include "core/settings/MatchBy.h"
 #include "desktop/tracks/SpanIndex.h"
 
 #include <cstddef>
@@ -22,11 +24,11 @@ public:
     enum class State { Planned, Carried };
 
     ChangeMap() = default;
-    /// The events of the change EDL and of both cuts. Events that aren't valid, or not at this rate, are left out. `origin` is what the clock of the
-    /// project shows at its time 0.
+    /// The events of the change EDL and of both cuts. Events that aren't valid, or not at this rate, are left out. `names` tells by
+    /// what the same picture is known. `origin` is what the clock of the project shows at its time 0.
     ChangeMap(const cadrel::core::EventList& change, const cadrel::core::EventList& oldCut,
               const cadrel::core::EventList& newCut, const cadrel::core::Framerate& framerate, double origin,
-              State state);
+              State state, cadrel::core::PictureNames names = {cadrel::core::MatchBy::RollName, {}});
 
     bool isEmpty() const { return m_stretches.empty(); }
     State state() const { return m_state; }
@@ -45,11 +47,15 @@ public:
     };
     std::optional<Move> moveOf(std::size_t event) const;
     /// Where an event puts its stretch. Nothing for one that isn't valid.
-    std::optional<Span> placeOf(std::size_t event) const;
+    std::optional<Span> placeOf(std::size_t event) const { return placeOf(event, m_state); }
+    /// Where its stretch stands in the old programme (Planned) or in the new one.
+    std::optional<Span> placeOf(std::size_t event, State programme) const;
     /// Where the pieces of a stretch stood that the change has moved, in the order of the new programme. Empty while nothing
     /// was carried over.
     std::vector<Span> formerPlaces(const Span& stretch) const;
-    /// The new picture, black aside, that no event brings sound for, in order and without overlaps. Empty while nothing was carried over.
+    /// The new picture, black aside, that no event brings sound for, in order and without overlaps. Before the first event and
+    /// after the last one the sound hasn't been touched, so that picture which is the same there isn't new. Empty while nothing
+    /// was carried over.
     const std::vector<Span>& withoutSound() const { return m_withoutSound; }
     /// Where the shots of the old (Planned) or of the new cut begin, in order.
     const std::vector<double>& cuts(State programme) const

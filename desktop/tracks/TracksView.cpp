@@ -173,7 +173,10 @@ bool TracksView::showsPreviewPlace()
 
 void TracksView::showPreviewPlace()
 {
-    scrollTo(m_scale.left() + (showsPreviewPlace() ? -previewOffset() : previewOffset()));
+    if (showsPreviewPlace())
+        scrollTo(m_scale.left() - previewOffset());
+    else if (index().preview())
+        scrollTo(m_scale.left() + previewOffset());
 }
 
 void TracksView::setRowSize(RowLayout::Size size)

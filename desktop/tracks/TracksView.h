@@ -58,6 +58,7 @@ public:
     /// The time at the left edge, in seconds of the project.
     void scrollTo(double seconds);
     /// From the programme to the same place of the preview stretch, a whole day later, and back.
+    /// Stays where it is while there is no preview.
     void showPreviewPlace();
     bool showsPreviewPlace();
     const TimeScale& scale() const { return m_scale; }
@@ -72,7 +73,8 @@ public:
     /// Whether outlines show where each clip stood before.
     void setGhosts(bool shown);
     bool showsGhosts() const { return m_showsGhosts; }
-    /// Marks the clips that an event of the change EDL moves, and scrolls to its place if wanted; nothing unmarks them.
+    /// Marks the clips that an event of the change EDL moves, and scrolls to its place if wanted; nothing unmarks them. While the
+    /// preview stretch is shown and the transport cycles in it, the place is the one there.
     void showEvent(std::optional<std::size_t> event, bool scrolls = true);
 
     /// The user has clicked on a clip: the index of the event in the change EDL that moves it or has moved it.
@@ -125,6 +127,7 @@ private:
     void update();
     /// The event that moves a clip, or has moved it there.
     std::optional<std::size_t> eventOf(const TrackRow& row, SpanIndex::Span clip);
+    bool isPreviewPlayed();
     SpanIndex findGhosts(const TrackRow& row) const;
     void viewChanged();
     void moveRows(int offset);

@@ -5,6 +5,7 @@
 #include "desktop/tracks/TrackLanes.h"
 #include "desktop/tracks/TracksView.h"
 #include "standin/base/Times.h"
+#include "standin/project/Project.h"
 
 #include <algorithm>
 #include <cmath>
@@ -30,13 +31,21 @@ void TracksView::showEvent(std::optional<std::size_t> event, bool scrolls)
 {
     update();
     m_shownEvent = event;
-    if (const auto place = event && scrolls ? m_change.placeOf(*event) : std::nullopt) {
-        const double first = m_scale.pixelAt(place->start);
+    const bool isInPreview = showsPreviewPlace() && isPreviewPlayed();
+    const auto programme = isInPreview ? ChangeMap::State::Carried : m_change.state();
+    if (const auto place = event && scrolls ? m_change.placeOf(*event, programme) : std::nullopt) {
+        const double start = place->start + (isInPreview ? previewOffset() : 0.0);
+        const double first = m_scale.pixelAt(start);
         // What is seen stays as it is if the event begins in it. Else it shows something before the event, too.
         if (first < 0.0 || first > 0.9 * viewWidth())
-            scrollTo(place->start - 0.2 * viewWidth() * m_scale.secondsPerPixel());
+            scrollTo(start - 0.2 * viewWidth() * m_scale.secondsPerPixel());
     }
     m_lanes->repaint();
+}
+
+bool TracksView::isPreviewPlayed()
+{
+    return m_index.preview() && m_project.cycleLeft().getValue() >= previewOffset() - m_clock.origin();
 }
 
 const SpanIndex& TracksView::ghostsOf(std::size_t row)

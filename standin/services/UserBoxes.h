@@ -20,6 +20,7 @@ public:
         std::vector<FileFilter> filters; ///< without any, every file can be chosen
         std::u16string folder;           ///< where the box opens; empty for no wish
         bool isSave = false;             ///< one file that is written, or else those that are opened
+        std::u16string name = {};        ///< proposed for the file that is written
     };
     struct Progress {
         std::u16string title;

@@ -290,8 +290,9 @@ bool JuceGuiAdapter::keyPressed(const juce::KeyPress& key)
         return invokeEditAction(IActionManager::Undo);
     if (isEditKey(key, 'z', true))
         return invokeEditAction(IActionManager::Redo);
-    // Tab moves the keyboard after this. What the host has handed over it has got.
-    if (!key.isKeyCode(juce::KeyPress::tabKey) && !m_keyIsFromHost && m_unusedKeys)
+    // Tab without Control moves the keyboard after this. What the host has handed over it has got.
+    const bool isForUs = key.isKeyCode(juce::KeyPress::tabKey) && !key.getModifiers().isCtrlDown();
+    if (!isForUs && !m_keyIsFromHost && m_unusedKeys)
         m_unusedKeys->sendOn(key.getKeyCode(), key.getTextCharacter());
     return false;
 }

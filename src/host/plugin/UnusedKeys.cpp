@@ -83,6 +83,8 @@ bool isKey(const ::XKeyEvent& event, int code, wchar_t character)
 {
     constexpr KeySym LastByte = 0xff;
     const LookedUpKey key(event);
+    if (key.symbol == XK_ISO_Left_Tab)
+        return code == '\t';
     if (key.character != 0 || character != 0)
         return key.character == character;
     if (isLatin1(key.symbol))

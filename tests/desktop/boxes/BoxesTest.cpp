@@ -264,6 +264,23 @@ TEST_F(BoxesTest, AskBeforeAFileIsOverwritten)
     EXPECT_EQ(cadrel::tests::contentOf(m_folder / "cut.edl"), "TITLE: x") << "The box itself writes nothing.";
 }
 
+TEST_F(BoxesTest, ProposeANameOfWhichAllButTheExtensionIsTypedOver)
+{
+    const auto saveAs = [this](const std::u16string& name) {
+        return m_boxes.chooseFiles(
+            {u"Save", {{"stage", "A project"}}, standin::toUtf16((m_folder / "").string()), true, name});
+    };
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(saveAs(u"reel3.stage"), Files{pathOf("reel3.stage")});
+    willType("film");
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(saveAs(u"reel.3.stage"), Files{pathOf("film.stage")});
+    willPress(juce::KeyPress::endKey);
+    willType("x");
+    willPress(juce::KeyPress::returnKey);
+    EXPECT_EQ(saveAs(u"reel3"), Files{pathOf("reel3x.stage")});
+}
+
 TEST_F(BoxesTest, OpenInTheFolderOfTheLastFile)
 {
     m_folder.write("cut.edl", "TITLE: x");

@@ -1,11 +1,15 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-// Whatever the user does: the mark tells whether the bytes differ, and what was stored opens again with the same bytes.
+// Whatever the user does: the mark tells whether the bytes differ, the place of the playhead aside, and what was stored opens again
+// with the same bytes.
 
 #include "tests/desktop/document/DocumentHost.h"
 #include "tests/support/standin/RandomProject.h"
 
 #include <rapidcheck/gtest.h>
+
+#include <regex>
+#include <string>
 
 namespace desktop::tests {
 
@@ -17,6 +21,12 @@ using standin::tests::CheckedChance;
 namespace {
 
 constexpr const char16_t* Names[] = {u"A", u"B", u"C"};
+
+std::string withoutPlayhead(const std::string& bytes)
+{
+    static const std::regex playhead(R"("position": [^,]*,\s*)");
+    return std::regex_replace(bytes, playhead, "", std::regex_constants::format_first_only);
+}
 
 } // namespace
 
@@ -108,7 +118,7 @@ RC_GTEST_PROP(DocumentLaw, TheMarkIsSetExactlyWhereTheBytesDifferFromThoseStored
     const std::uint64_t steps = 1 + chance.below(30);
     for (std::uint64_t step = 0; step < steps; ++step) {
         user.act(document, chance);
-        const bool differs = user.bytesOf(document) != user.stored;
+        const bool differs = withoutPlayhead(user.bytesOf(document)) != withoutPlayhead(user.stored);
         RC_ASSERT(document.settleUnsaved() == differs);
         RC_ASSERT(document.isUnsaved() == differs);
     }
@@ -138,21 +148,21 @@ RC_GTEST_PROP(DocumentLaw, TheAutosaveOpensWithTheBytesOfTheProjectWhereThoseDif
     user.idle();
     user.idle();
     const fs::path path = document.path();
-    const std::string bytes = user.bytesOf(document);
+    const std::string bytes = withoutPlayhead(user.bytesOf(document));
     const auto autosave = Autosave::read(path);
     RC_ASSERT(autosave.has_value() == document.settleUnsaved());
     if (!autosave)
         return;
-    RC_ASSERT(autosave->content == bytes);
+    RC_ASSERT(withoutPlayhead(autosave->content) == bytes);
     const std::string left = contentOf(Autosave::pathFor(path));
     user.documents.close(document);
     writeFile(Autosave::pathFor(path), left);
 
     OpenDocument& recovered = user.documents.open(path, OpenDocuments::Work::Recover);
 
-    RC_ASSERT(user.bytesOf(recovered) == bytes);
+    RC_ASSERT(withoutPlayhead(user.bytesOf(recovered)) == bytes);
     RC_ASSERT(recovered.isUnsaved());
-    RC_ASSERT(user.saved(recovered) == bytes);
+    RC_ASSERT(withoutPlayhead(user.saved(recovered)) == bytes);
 }
 
 } // namespace desktop::tests

@@ -127,13 +127,27 @@ TEST_F(OpenDocumentTest, ShowsWhatAModuleHasChangedOfItsOwnAfterAnIdleCall)
     EXPECT_FALSE(document.isUnsaved());
 }
 
-TEST_F(OpenDocumentTest, ShowsThatThePlayheadHasMovedAfterAnIdleCall)
+TEST_F(OpenDocumentTest, DoesNotCountTheMovedPlayheadAsWork)
 {
     OpenDocument& document = opened();
     document.project().position().setValue(0, 3.5);
 
     idle();
-    EXPECT_TRUE(document.isUnsaved());
+    EXPECT_FALSE(document.isUnsaved());
+    EXPECT_FALSE(document.settleUnsaved());
+    EXPECT_EQ(document.project().position().getValue(), 3.5);
+
+    renameTrack(document, u"FX 1");
+    application.edits().undo(document.project());
+    EXPECT_FALSE(document.settleUnsaved()) << "The rest is as it was.";
+
+    renameTrack(document, u"FX 1");
+    EXPECT_TRUE(document.settleUnsaved());
+    EXPECT_TRUE(documents.save(document).isSaved());
+    EXPECT_NE(contentOf(document.path()).find("\"position\": 3.5"), std::string::npos) << "It is stored with the work.";
+    EXPECT_FALSE(document.settleUnsaved());
+    document.project().position().setValue(0, 0.0);
+    EXPECT_FALSE(document.settleUnsaved());
 }
 
 TEST_F(OpenDocumentTest, StaysUnsavedWhereAnUndoIsFollowedBySettingsThatNoUndoTakesBack)

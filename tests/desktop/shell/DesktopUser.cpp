@@ -89,6 +89,20 @@ std::vector<Window> childrenOf(Display* display, Window window)
     return found;
 }
 
+/// 0 for one that lies in no other, and for one that has gone.
+Window parentOf(Display* display, Window window)
+{
+    Window root = 0;
+    Window parent = 0;
+    Window* children = nullptr;
+    unsigned count = 0;
+    if (XQueryTree(display, window, &root, &parent, &children, &count) == 0)
+        return 0;
+    if (children)
+        XFree(children);
+    return parent == root ? 0 : parent;
+}
+
 bool isViewable(Display* display, Window window)
 {
     XWindowAttributes attributes;
@@ -385,19 +399,39 @@ DesktopUser::Area DesktopUser::areaOf(unsigned long window) const
 
 DesktopUser::Area DesktopUser::frame() const
 {
-    for (Window window = m_window;;) {
-        Window root = 0;
-        Window parent = 0;
-        Window* children = nullptr;
-        unsigned count = 0;
-        if (XQueryTree(m_display, window, &root, &parent, &children, &count) == 0)
-            throw std::runtime_error("the window has gone");
-        if (children)
-            XFree(children);
-        if (parent == root)
-            return areaOf(window);
-        window = parent;
-    }
+    Window window = m_window;
+    while (const Window around = parentOf(m_display, window))
+        window = around;
+    return areaOf(window);
+}
+
+void DesktopUser::waitForKeyboardInModule()
+{
+    waitFor("Cadrel's window has the keyboard", [this] {
+        Window window = m_user.focus();
+        while (window > PointerRoot && window != m_container)
+            window = parentOf(m_display, window);
+        return window == m_container;
+    });
+}
+
+void DesktopUser::pressOnTracks(unsigned long key)
+{
+    waitForRest(20);
+    const auto before = m_windows.pixelsOf(m_window);
+    press(key);
+    waitFor("the tracks take the key", [&] { return m_windows.pixelsOf(m_window) != before; });
+}
+
+void DesktopUser::openAndCloseMenus()
+{
+    waitForRest(20);
+    const int windows = m_windows.windowCount();
+    press(XK_F10);
+    waitFor("the menus are open", [&] { return m_windows.windowCount() > windows; });
+    waitForRest(20);
+    press(XK_Escape);
+    waitFor("the menus are closed", [&] { return m_windows.windowCount() == windows; });
 }
 
 void DesktopUser::waitForRest(int turns)

@@ -69,6 +69,12 @@ public:
         m_user.press(key, held, heldToo);
     }
     void type(const std::string& text) { m_user.type(text); }
+    /// Waits until the keyboard is in Cadrel's window.
+    void waitForKeyboardInModule();
+    /// Presses a key that changes what the tracks show, and waits until it does.
+    void pressOnTracks(unsigned long key);
+    /// Opens the menus by the keyboard, and closes them again.
+    void openAndCloseMenus();
     /// As a window manager does it for the user.
     void closeWindow();
     void resizeTo(int width, int height);

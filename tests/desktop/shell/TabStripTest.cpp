@@ -37,5 +37,19 @@ TEST(TabStrip, TellsWhichDocumentIsMeantAndNotWhereItsTabStands)
     EXPECT_EQ(closed, std::vector<std::uint64_t>{7});
 }
 
+TEST(TabStrip, KnowsTheTabsBesideTheActiveOneRoundAndRound)
+{
+    const juce::ScopedJuceInitialiser_GUI juce;
+    TabStrip strip;
+    EXPECT_FALSE(strip.tabAfter(1));
+    strip.setTabs({{7, "a", "", false}, {8, "b", "", false}, {9, "c", "", false}}, 2);
+    EXPECT_EQ(strip.tabAfter(1), 7U);
+    EXPECT_EQ(strip.tabAfter(-1), 8U);
+    strip.setTabs({{7, "a", "", false}, {8, "b", "", false}}, 0);
+    EXPECT_EQ(strip.tabAfter(-1), 8U);
+    strip.setTabs({{7, "a", "", false}}, 0);
+    EXPECT_EQ(strip.tabAfter(1), 7U);
+}
+
 } // namespace
 } // namespace desktop::tests

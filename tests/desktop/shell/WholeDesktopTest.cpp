@@ -685,6 +685,52 @@ TEST_P(WholeDesktopTest, ComesUpAsItWasTheLastTime)
     EXPECT_EQ(m_user->area().height, 900);
 }
 
+TEST_P(WholeDesktopTest, CanBeWorkedByTheKeyboardAlone)
+{
+    start();
+    m_user->pressOnTracks('+'); // A project that has just been opened has the keyboard on its tracks.
+    m_user->openAndCloseMenus();
+    m_user->pressOnTracks('+');
+    m_user->openAndCloseMenus();
+    m_user->press('o', XK_Control_L);
+    m_user->waitForBox(true);
+    m_user->press(XK_Escape);
+    m_user->waitForBox(false);
+    m_user->pressOnTracks('+');
+
+    m_user->press(XK_F6);
+    m_user->waitForKeyboardInModule();
+    m_user->press(XK_F6);
+    m_user->pressOnTracks('+');
+    constexpr int ProjectMenu = 3;
+    constexpr int CadrelEntry = 0;
+    m_user->chooseInMenu(ProjectMenu, CadrelEntry);
+    m_user->waitForKeyboardInModule();
+    m_user->openAndCloseMenus();
+    m_user->press(XK_F6);
+    m_user->waitForKeyboardInModule();
+}
+
+TEST_P(WholeDesktopTest, GoesFromTabToTabByTheKeyboard)
+{
+    const fs::path other = m_folder / "other.stage";
+    fs::copy_file(m_file, other);
+    m_user.emplace(m_folder / "", std::vector<std::string>{m_file.string(), other.string()});
+    const auto waitFor = [this](const std::string& name) {
+        m_user->waitForTitle(name + " is in front",
+                             [&](const std::string& text) { return text == name + " - Cadrel"; });
+    };
+    waitFor("other.stage");
+    m_user->press(XK_Tab, XK_Control_L);
+    waitFor("reel3.stage");
+    m_user->press(XK_F6);
+    m_user->waitForKeyboardInModule();
+    m_user->press(XK_Tab, XK_Control_L);
+    waitFor("other.stage");
+    m_user->press(XK_Tab, XK_Control_L, XK_Shift_L);
+    waitFor("reel3.stage");
+}
+
 INSTANTIATE_TEST_SUITE_P(WithoutAndWithAWindowManager, WholeDesktopTest, testing::Bool(),
                          [](const auto& each) { return each.param ? "WithAWindowManager" : "WithoutAWindowManager"; });
 

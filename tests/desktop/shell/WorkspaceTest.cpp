@@ -165,10 +165,12 @@ TEST_F(WorkspaceTest, SavesAgainWhatIsGoneFromTheDisk)
 TEST_F(WorkspaceTest, SavesUnderAnotherNameWithTheExtensionOfItsForm)
 {
     OpenDocument& document = edited();
+    const std::string former = document.name();
     boxes.choices = {{standin::toUtf16((folder / "new.stage").string())}};
     EXPECT_TRUE(workspace.saveAs(document));
     EXPECT_EQ(document.name(), "new.stage");
     ASSERT_EQ(boxes.questions.size(), 1U);
+    EXPECT_EQ(boxes.questions[0].name, standin::toUtf16(former)) << "to be changed";
     EXPECT_TRUE(boxes.questions[0].isSave);
     ASSERT_EQ(boxes.questions[0].filters.size(), 1U);
     EXPECT_EQ(boxes.questions[0].filters[0].extension, "stage");

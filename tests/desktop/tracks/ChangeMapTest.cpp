@@ -175,6 +175,30 @@ TEST_F(ChangeMapTest, DoesNotCountBlackAsNewPicture)
     expectSpans(map(State::Carried).withoutSound(), {{20.0, 25.0}});
 }
 
+TEST_F(ChangeMapTest, DoesNotCountPictureAsNewThatStaysInPlaceOutsideOfTheEvents)
+{
+    // As a run leaves the list that takes only what has to move; shot A stays.
+    m_change.erase(0, 1);
+    ASSERT_EQ(m_change.size(), 2U);
+    expectSpans(map(State::Carried).withoutSound(), {{20.0, 25.0}});
+    // A ends a frame earlier in the new cut, and begins with other frames for one second.
+    m_new.clear();
+    m_new.add(makeEvent("A", "01:00:05:00", "01:00:06:00", "01:00:00:00", "01:00:01:00"));
+    m_new.add(makeEvent("A", "01:00:01:00", "01:00:09:24", "01:00:01:00", "01:00:09:24"));
+    m_new.add(makeEvent("N", "01:00:00:00", "01:00:00:01", "01:00:09:24", "01:00:10:00"));
+    expectSpans(map(State::Carried).withoutSound(), {{0.0, 1.0}, {9.96, 10.0}});
+}
+
+TEST_F(ChangeMapTest, CountsPictureThatStaysInPlaceAmidTheEventsAsWithoutSound)
+{
+    // The list was carried out from its first to its last event, and D isn't in it.
+    m_old.add(makeEvent("D", "01:00:00:00", "01:00:10:00", "01:00:40:00", "01:00:50:00"));
+    m_new.add(makeEvent("D", "01:00:00:00", "01:00:10:00", "01:00:40:00", "01:00:50:00"));
+    expectSpans(map(State::Carried).withoutSound(), {{20.0, 25.0}});
+    m_change.add(makeEvent("E", "01:00:50:00", "01:00:55:00", "01:00:45:00", "01:00:55:00"));
+    expectSpans(map(State::Carried).withoutSound(), {{20.0, 25.0}, {40.0, 45.0}});
+}
+
 TEST_F(ChangeMapTest, HasTheCutsOfBothPictures)
 {
     const ChangeMap carried = map(State::Carried);

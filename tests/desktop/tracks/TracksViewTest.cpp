@@ -151,7 +151,7 @@ TEST_F(ReelViewTest, ShowsMoreTracksWhereTheyAreLow)
 TEST_F(ReelViewTest, ShowsThePreviewPlaceADayLater)
 {
     m_view->fitAll();
-    m_view->showPreviewPlace();
+    m_view->scrollTo(m_view->scale().left() + m_view->previewOffset());
     expectPicture(*m_view, "tracks-reel-preview");
 }
 
@@ -263,6 +263,7 @@ TEST_F(TracksViewTest, GoesToTheSamePlaceOfThePreviewAndBackWithOneKey)
 {
     const auto track = m_host.addTrack(TypeWord::Audio, u"DIA 1");
     m_host.addClip(track, u"film", 0.0, 100.0);
+    m_host.addClip(track, u"copy", 86400.0, 86500.0);
     m_view->projectChanged();
     m_view->fitAll();
     const double left = m_view->scale().left();
@@ -480,6 +481,35 @@ TEST_F(TracksViewTest, ScrollsToAnEventThatIsOutOfSight)
     m_view->showEvent(std::nullopt);
     m_view->showEvent(77);
     EXPECT_NEAR(m_view->scale().pixelAt(20.0), 0.2 * LaneWidth, 1e-6);
+}
+
+TEST_F(TracksViewTest, StaysInThePreviewWhenTheNextEventIsSelected)
+{
+    const double day = 24.0 * 60.0 * 60.0;
+    const auto track = m_host.addTrack(TypeWord::Audio, u"DIA 1");
+    m_host.addClip(track, u"film", 0.0, 30.0);
+    m_view->projectChanged();
+    m_view->fitAll();
+    const auto fitted = m_view->scale();
+    m_view->showPreviewPlace();
+    EXPECT_EQ(m_view->scale(), fitted) << "There is no preview yet.";
+
+    m_host.addClip(track, u"preview", day + 2.0, day + 5.0);
+    m_host.project.cycleLeft().setValue(0, day + 2.0);
+    m_view->projectChanged();
+    m_view->setChange(change(ChangeMap::State::Planned));
+    m_view->fitAll();
+    m_view->zoomBy(4.0);
+    m_view->scrollTo(-10.0);
+    m_view->showPreviewPlace();
+    ASSERT_TRUE(m_view->showsPreviewPlace());
+    m_view->showEvent(1);
+    EXPECT_NEAR(m_view->scale().pixelAt(day + 20.0), 0.2 * LaneWidth, 1e-3) << "where the event will be";
+
+    // The source is played in the film.
+    m_host.project.cycleLeft().setValue(0, 2.0);
+    m_view->showEvent(1);
+    EXPECT_FALSE(m_view->showsPreviewPlace());
 }
 
 TEST_F(TracksViewTest, LocksATrackAsAnEntryOfTheUndoList)
