@@ -3,7 +3,7 @@
 // `cadrel-desktop [PROJECT...]`: the stand-in host with windows, into which it loads Cadrel. `cadrel open` starts it.
 
 #include "desktop/shell/DesktopProgram.h"
-#include "desktop/shell/XSession.h"
+#include "desktop/x11/XSession.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 

@@ -97,7 +97,8 @@ std::optional<std::string> meaningOf(const std::string& key, const Attribute& at
 {
     if (key.starts_with(standin::ProjectForm::KeyPrefix))
         return std::string();
-    if (key == AttributeKey::Storage || key == AttributeKey::StorageChecksum || key == AttributeKey::EventUserId)
+    if (key == AttributeKey::Storage || key == AttributeKey::StorageChecksum || key == AttributeKey::EventUserId ||
+        key == AttributeKey::SessionEnd || key == AttributeKey::SessionCutEnd)
         return std::string();
     const auto* const number = std::get_if<Velmark::int64>(&attribute.value);
     const auto* const text = std::get_if<std::string>(&attribute.value);

@@ -66,11 +66,16 @@ OpenDocument::OpenDocument(std::uint64_t id, standin::Application& application, 
         m_autosavedVersion = m_mark.version();
     if (recovery && recovery->basis != m_file.print())
         m_formerBasis = recovery->basis;
-    if (!m_lock.isOurs() && !m_lock.holder())
-        m_autosaveFault = path().parent_path().string() + ": no autosave can be written into this folder";
 }
 
 OpenDocument::~OpenDocument() = default;
+
+std::string OpenDocument::autosaveFault() const
+{
+    if (!m_lock.isOurs() && !m_lock.holder())
+        return path().parent_path().string() + ": no autosave can be written into this folder";
+    return m_autosaveFault;
+}
 
 bool OpenDocument::settleUnsaved()
 {

@@ -73,7 +73,7 @@ public:
     /// What has become of the file meanwhile, by its size, time and place, and its content where one of these differs.
     StoredFile::State fileState() { return m_file.look(); }
     /// Why the last autosave couldn't be written, in one line; empty as long as they can.
-    const std::string& autosaveFault() const { return m_autosaveFault; }
+    std::string autosaveFault() const;
     /// Where the unsaved work of another program is, which had the project open as well and has ended; answered once.
     std::optional<std::filesystem::path> takeWorkOfOther() { return std::exchange(m_workOfOther, std::nullopt); }
 

@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "desktop/shell/XContainer.h"
+#include "desktop/x11/XContainer.h"
 #include "standin/window/WindowSystem.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>

@@ -3,10 +3,10 @@
 #pragma once
 
 #include "desktop/shell/EmbeddedView.h"
-#include "desktop/shell/ManagedScreen.h"
 #include "desktop/shell/MenuBarLook.h"
 #include "desktop/shell/Menus.h"
 #include "desktop/shell/TabStrip.h"
+#include "desktop/x11/ManagedScreen.h"
 #include "gui/look/LookAndFeel.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>

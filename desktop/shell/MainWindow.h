@@ -3,8 +3,8 @@
 #pragma once
 
 #include "desktop/shell/MainView.h"
-#include "desktop/shell/ManagedScreen.h"
 #include "desktop/shell/WindowMemory.h"
+#include "desktop/x11/ManagedScreen.h"
 
 #include <juce_gui_basics/juce_gui_basics.h>
 

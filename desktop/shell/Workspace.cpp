@@ -205,8 +205,9 @@ bool Workspace::closeAll()
 bool Workspace::reload(OpenDocument& document)
 {
     try {
-        m_told.erase(&document);
+        const OpenDocument* const reloaded = &document;
         m_documents.reload(document);
+        m_told.erase(reloaded);
         return true;
     } catch (const DocumentError& error) {
         tell(error.what());
@@ -249,9 +250,13 @@ void Workspace::lookAtAutosaves()
         if (const auto work = document.takeWorkOfOther())
             return tell("Another program has ended without saving " + quotedName(document.path()) +
                         ". Its work is kept in the file " + quotedName(*work) + ".");
-        const std::string& fault = document.autosaveFault();
-        if (fault.empty() || !document.isUnsaved() || !m_toldFaults.try_emplace(document.id(), fault).second)
+        const std::string fault = document.autosaveFault();
+        std::string& told = m_toldFaults[document.id()];
+        if (fault.empty())
+            told.clear();
+        if (fault == told || !document.isUnsaved())
             continue;
+        told = fault;
         return tell("Unsaved work on " + quotedName(document.path()) + " isn't kept for you: " + fault +
                     ".\n\nSave it now and then.");
     }
@@ -263,8 +268,8 @@ void Workspace::lookAtFile()
     if (!document)
         return;
     const StoredFile::State state = document->fileState();
-    const auto [known, isNew] = m_told.try_emplace(document, StoredFile::State::AsStored);
-    if (std::exchange(known->second, state) == state)
+    StoredFile::State& told = m_told.try_emplace(document, StoredFile::State::AsStored).first->second;
+    if (std::exchange(told, state) == state)
         return;
     const std::string name = quotedName(document->path());
     if (state == StoredFile::State::Missing)

@@ -136,6 +136,8 @@ struct AttributeKey {
     /// On a project whose session has an end of its own: that end in nanoseconds from the time origin, an integer. The host
     /// sets it when it opens the project, not as a persistent one, and stores the session with the end that stands there.
     static constexpr const char* SessionEnd = "Cadrel:SessionEnd";
+    /// On such a project: the frame at which the cut ends with which that end stands, an integer.
+    static constexpr const char* SessionCutEnd = "Cadrel:SessionCutEnd";
     /// In these lists: the numbers.
     static constexpr const char* Numbers = "Numbers";
     /// On a marker, a video and a folder track: the role of the track, an integer.

@@ -313,6 +313,7 @@ void JuceGuiAdapter::mouseDown(const juce::MouseEvent& /*event*/)
     juce::Component* const former = peer->getLastFocusedSubcomponent();
     if (former == this || former == getCurrentlyFocusedComponent() || !former->getWantsKeyboardFocus())
         return;
+    endPassingOver(); // of a click before this one in the same turn
     former->setWantsKeyboardFocus(false);
     m_passedOver = former;
 }

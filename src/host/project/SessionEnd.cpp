@@ -5,6 +5,7 @@
 #include "core/edl/EventBase.h"
 #include "core/model/DataModel.h"
 #include "core/protect/ProtectedRun.h"
+#include "core/time/SecondsRange.h"
 #include "core/time/Timecode.h"
 #include "host/border/HostFailure.h"
 #include "host/border/NodeReading.h"
@@ -26,13 +27,13 @@ constexpr double NanosecondsPerSecond = 1e9;
 /// No project reaches further, and what is stored may be damaged.
 constexpr int64 Furthest = 4'000'000'000'000'000'000;
 
-std::optional<int64> endIn(IProjectNode& root)
+std::optional<int64> numberIn(IProjectNode& root, const char* key)
 {
-    FVariant end;
-    if (root.getAttribute(AttributeKey::SessionEnd, end) != ResultOk || !end.isInteger())
+    FVariant value;
+    if (root.getAttribute(key, value) != ResultOk || !value.isInteger())
         return std::nullopt;
-    const int64 time = end.asInteger();
-    return time >= 0 && time <= Furthest ? std::optional(time) : std::nullopt;
+    const int64 number = value.asInteger();
+    return number >= 0 && number <= Furthest ? std::optional(number) : std::nullopt;
 }
 
 /// The frame at which the last event of a cut ends.
@@ -49,46 +50,70 @@ std::int32_t endOf(const core::EventList& cut)
 } // namespace
 
 SessionEnd::SessionEnd(Project& project)
-    : m_project(project), m_end(endIn(*required(query<IProjectNode>(project.document()))))
+    : m_project(project), m_end(numberIn(*required(query<IProjectNode>(project.document())), AttributeKey::SessionEnd))
 {
     if (m_end)
-        m_soundEnd = soundEnd();
+        m_sound = sound();
 }
 
 void SessionEnd::follow(const core::FrameRange& allowed) const
 {
     if (!m_end)
         return;
-    const auto moved = static_cast<double>(*m_end) + std::round(shift(allowed) * NanosecondsPerSecond);
-    const auto end = static_cast<int64>(std::clamp(moved, 0.0, static_cast<double>(Furthest)));
-    if (end != *m_end)
-        requireOk(required(query<IProjectNode>(m_project.document()))
-                      ->setAttribute(AttributeKey::SessionEnd, FVariant::integer(end), false));
+    const std::optional<CutEnds> ends = cutEnds();
+    if (!ends) {
+        moveBy(sound().end - m_sound.end);
+        return;
+    }
+    const auto standsWith = numberIn(*required(query<IProjectNode>(m_project.document())), AttributeKey::SessionCutEnd);
+    if (std::max(ends->before, ends->after) > allowed.end || standsWith.value_or(ends->before) != ends->before)
+        return;
+    moveBy((ends->after - ends->before) / core::Timecode::framerate().rate);
+    set(AttributeKey::SessionCutEnd, ends->after, true);
 }
 
-double SessionEnd::shift(const core::FrameRange& allowed) const
+std::optional<SessionEnd::CutEnds> SessionEnd::cutEnds() const
 {
     const core::DataModel& model = m_project.model();
     if (core::ProtectedRun::sourceOf(model) == core::ProtectedRun::Source::Given)
-        return soundEnd() - m_soundEnd;
-    const std::int32_t before = endOf(model.oldEdl());
-    const std::int32_t after = endOf(model.newEdl());
-    if (std::max(before, after) > allowed.end)
-        return 0.0;
-    return (after - before) / core::Timecode::framerate().rate;
+        return std::nullopt;
+    const CutEnds ends{endOf(model.oldEdl()), endOf(model.newEdl())};
+    const auto isBefore = [&](std::int32_t cutEnd, const Sound& sound) {
+        return cutEnd / core::Timecode::framerate().rate - m_project.timeOrigin() < sound.lastStart + core::SameInstant;
+    };
+    // Another reel, which other lists carry.
+    if (isBefore(ends.before, m_sound) && isBefore(ends.after, sound()))
+        return std::nullopt;
+    return ends;
 }
 
-double SessionEnd::soundEnd() const
+void SessionEnd::moveBy(double seconds) const
+{
+    const auto moved = static_cast<double>(*m_end) + std::round(seconds * NanosecondsPerSecond);
+    set(AttributeKey::SessionEnd, static_cast<int64>(std::clamp(moved, 0.0, static_cast<double>(Furthest))), false);
+}
+
+void SessionEnd::set(const char* key, int64 value, bool isStored) const
+{
+    IProjectNode& root = *required(query<IProjectNode>(m_project.document()));
+    if (numberIn(root, key) != value)
+        requireOk(root.setAttribute(key, FVariant::integer(value), isStored));
+}
+
+SessionEnd::Sound SessionEnd::sound() const
 {
     const double preview = m_project.previewOffset() - m_project.timeOrigin();
-    double end = 0.0;
+    Sound found;
     for (const Track& track : m_project.tracksOfType(TypeWord::Audio)) {
         for (const Counted<IProjectNode>& clip : childrenOf(*required(query<IProjectNode>(track.node())))) {
-            if (clip->getStart(nullptr) < preview)
-                end = std::max(end, clip->getEnd(nullptr));
+            const double start = clip->getStart(nullptr);
+            if (start < preview) {
+                found.lastStart = std::max(found.lastStart, start);
+                found.end = std::max(found.end, clip->getEnd(nullptr));
+            }
         }
     }
-    return end;
+    return found;
 }
 
 } // namespace cadrel::host

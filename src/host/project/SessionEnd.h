@@ -5,6 +5,7 @@
 #include "core/picture/FrameRange.h"
 #include "velmark/FUnknown.h"
 
+#include <cstdint>
 #include <optional>
 
 namespace cadrel::host {
@@ -17,25 +18,39 @@ class Project;
 ///
 ///     before    |== old cut ==|  tail  |end
 ///     after     |== new cut =====|  tail  |end
+///
+/// With a reel that begins after both cuts, and with a change list alone, it follows the last clip.
 class SessionEnd {
 public:
     /// Before the run, once the project has a preview offset. The project outlives it.
     explicit SessionEnd(Project& project);
 
-    /// After the run, within its transaction. By how much it moves, both cuts tell and, where there is only a change list,
-    /// the last clip. It stays where the programme ends outside of what the user lets change. Throws
-    /// Result::HostCallFailed.
+    /// After the run, within its transaction. The end stays where the programme ends outside of what the user lets change, and
+    /// where it has come with other tracks already, to another cut than the old one. Throws Result::HostCallFailed.
     void follow(const core::FrameRange& allowed) const;
 
 private:
-    /// Of the last clip before the preview stretch, in seconds.
-    double soundEnd() const;
-    /// How many seconds later the programme ends.
-    double shift(const core::FrameRange& allowed) const;
+    /// Of the clips before the preview stretch, in seconds of the host.
+    struct Sound {
+        double lastStart = 0.0;
+        double end = 0.0;
+    };
+    /// In frames of the timecode.
+    struct CutEnds {
+        std::int32_t before;
+        std::int32_t after;
+    };
+
+    Sound sound() const;
+    /// Nothing where the last clip tells how far the end goes.
+    std::optional<CutEnds> cutEnds() const;
+    void set(const char* key, Velmark::int64 value, bool isStored) const;
+    /// By so many seconds.
+    void moveBy(double seconds) const;
 
     Project& m_project;
-    std::optional<Velmark::int64> m_end; ///< in nanoseconds
-    double m_soundEnd = 0.0;             ///< before the run
+    std::optional<Velmark::int64> m_end; ///< in nanoseconds of the host
+    Sound m_sound;                       ///< before the run
 };
 
 } // namespace cadrel::host

@@ -179,7 +179,7 @@ unsigned long DesktopUser::findWindow(unsigned long within) const
 
 void DesktopUser::waitFor(const std::string& what, const std::function<bool()>& condition)
 {
-    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
+    const auto end = std::chrono::steady_clock::now() + std::chrono::minutes(1);
     while (!condition()) {
         if (!isRunning() || std::chrono::steady_clock::now() > end)
             throw std::runtime_error("it doesn't come about that " + what + "; the title is " + title());

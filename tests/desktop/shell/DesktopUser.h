@@ -24,7 +24,7 @@ namespace desktop::tests {
 
 /// The desktop program in a process of its own, and a user in front of it with mouse and keyboard. The window gets a size in which
 /// Cadrel's has its smallest one, so that its controls stand where WindowPlaces says. Everything that doesn't come about within
-/// thirty seconds, or before the program ends, throws std::runtime_error.
+/// a minute, or before the program ends, throws std::runtime_error.
 class DesktopUser {
 public:
     /// Whether the window gets the size in which controls can be found, or keeps the one that the program has given it.

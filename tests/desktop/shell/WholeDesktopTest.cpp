@@ -10,6 +10,7 @@
 #include "desktop/document/Autosave.h"
 #include "desktop/document/DocumentLock.h"
 #include "desktop/tracks/TrackIndex.h"
+#include "desktop/x11/ManagedScreen.h"
 #include "gui/look/Palette.h"
 #include "gui/table/StoredTable.h"
 #include "standin/Application.h"
@@ -91,9 +92,12 @@ public:
             execlp("openbox", "openbox", "--sm-disable", static_cast<char*>(nullptr));
             _exit(127);
         }
-        std::this_thread::sleep_for(std::chrono::milliseconds(500));
-        if (waitpid(m_process, nullptr, WNOHANG) != 0)
-            throw std::runtime_error("no window manager; openbox has to be installed");
+        const ManagedScreen screen;
+        for (int turn = 0; !screen.hasManager(); ++turn) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+            if (turn == 3000 || waitpid(m_process, nullptr, WNOHANG) != 0)
+                throw std::runtime_error("no window manager; openbox has to be installed");
+        }
     }
     WindowManager(const WindowManager&) = delete;
     WindowManager& operator=(const WindowManager&) = delete;

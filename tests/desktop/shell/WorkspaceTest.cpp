@@ -199,6 +199,18 @@ TEST_F(WorkspaceTest, ReloadsAChangedFileWhereTheUserWantsThat)
     EXPECT_EQ(documents.active()->project().allTracks().size(), 3U);
 }
 
+TEST_F(WorkspaceTest, AsksOnceWhetherAFileIsReloadedThatCannotBeRead)
+{
+    opened();
+    folder.write("reel.stage", "{");
+    boxes.answers = {u"Reload", u"Reload"};
+    workspace.lookAtFile();
+    const std::size_t told = boxes.messages.size();
+    EXPECT_EQ(told, 2U) << "The question, and why it can't be done.";
+    workspace.lookAtFile();
+    EXPECT_EQ(boxes.messages.size(), told);
+}
+
 TEST_F(WorkspaceTest, KeepsUnsavedWorkAsAFileThatItNamesWhenAChangedFileIsReloaded)
 {
     edited();
@@ -399,6 +411,26 @@ TEST_F(WorkspaceTest, TellsOnceThatUnsavedWorkHasNoAutosave)
         EXPECT_EQ(boxes.messages.size(), 1U);
         EXPECT_NE(lastMessage().find("reel.stage.autosave: is in the way"), std::string::npos) << lastMessage();
     }
+}
+
+TEST_F(WorkspaceTest, TellsAgainThatUnsavedWorkHasNoAutosaveAfterItHadOne)
+{
+    const fs::path inTheWay = folder.write("reel.stage.autosave", "my notes");
+    OpenDocument& document = opened();
+    const auto edit = [&](const char16_t* name) {
+        renameTrack(document, name);
+        idle();
+        workspace.lookAtAutosaves();
+    };
+    edit(u"A");
+    EXPECT_EQ(boxes.messages.size(), 1U);
+    fs::remove(inTheWay);
+    edit(u"B");
+    EXPECT_EQ(boxes.messages.size(), 1U);
+    fs::remove(inTheWay);
+    folder.write("reel.stage.autosave", "my notes");
+    edit(u"C");
+    EXPECT_EQ(boxes.messages.size(), 2U);
 }
 
 TEST_F(WorkspaceTest, TellsOnceWhereTheWorkOfAnotherProgramIsThatHasEnded)

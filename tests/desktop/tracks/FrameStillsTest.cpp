@@ -162,15 +162,3 @@ TEST_F(FrameStillsTest, AskAgainForAPictureOfAFileThatHasComeBack)
     EXPECT_EQ(pollForAWhile(), 0) << "A picture isn't asked for again.";
     m_stills.reset();
 }
-
-TEST_F(FrameStillsTest, DoNotAskAgainForWhatIsNotSeenAnyMore)
-{
-    m_stills.emplace(m_host.context(), FrameStills::Capacity, std::chrono::milliseconds(0));
-    m_stills->still(m_clip, 24, 40); // This host has names of frames alone.
-    ASSERT_TRUE(waitForOne());
-    m_stills->poll();
-    m_stills->startAsking();
-    pollForAWhile();
-    EXPECT_EQ(m_stills->wantedCount(), 0U);
-    EXPECT_FALSE(m_stills->still(m_clip, 24, 40).isNull()) << "It is kept.";
-}

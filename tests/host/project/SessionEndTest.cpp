@@ -134,6 +134,82 @@ TEST_P(SessionEndTest, GoesBackWithTheRunThatIsUndone)
     EXPECT_EQ(end(), inHost(27));
 }
 
+// DX first, then FX, as people work.
+TEST_P(SessionEndTest, MovesOnceWhereTracksAreConformedOneAfterTheOther)
+{
+    const AdaptedHost::Node other = host.addTrack(TypeWord::Audio, u"FX");
+    host.addSound(other, u"three", 0.0, 20.0);
+    host.settings().setApplyTo(core::ApplyTo::SelectedTracks);
+    const auto conformAlone = [&](const AdaptedHost::Node& alone) {
+        for (const AdaptedHost::Node& each : {track, other})
+            dynamic_cast<standin::Node&>(*each).setSelected(each.get() == alone.get());
+        host.conform();
+        return end();
+    };
+    setCuts("01:00:20:00", "01:00:12:00");
+    host.carryOver("01:00:00:00", "01:00:12:00", "01:00:00:00", "01:00:12:00");
+
+    EXPECT_EQ(conformAlone(track), inHost(17));
+    EXPECT_EQ(conformAlone(other), inHost(17));
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(end(), inHost(17));
+    ASSERT_TRUE(host.undo());
+    EXPECT_EQ(conformAlone(other), inHost(17)) << "and once more, as nothing has been conformed any more";
+}
+
+TEST_P(SessionEndTest, ComesBackWithTheCut)
+{
+    setCuts("01:00:20:00", "01:00:12:00");
+    host.carryOver("01:00:00:00", "01:00:12:00", "01:00:00:00", "01:00:12:00");
+    host.conform();
+    host.model().oldEdl().clear();
+    host.model().newEdl().clear();
+    setCuts("01:00:12:00", "01:00:20:00");
+
+    host.conform();
+
+    EXPECT_EQ(end(), inHost(25));
+}
+
+TEST_P(SessionEndTest, StaysWhereAnotherReelThatStaysComesAfterTheCuts)
+{
+    host.addSound(track, u"second reel", 90.0, 100.0);
+    setEnd(FVariant::integer(inHost(105)));
+    host.settings().setRestrictRange(true);
+    host.settings().setPreserveMaterial(AdaptedHost::onClock(0.0), AdaptedHost::onClock(50.0));
+    setCuts("01:00:20:00", "01:00:12:00");
+    host.carryOver("01:00:00:00", "01:00:12:00", "01:00:00:00", "01:00:12:00");
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (std::vector<std::string>{"one 0-10", "two 10-12", "second reel 90-100"}));
+    EXPECT_EQ(end(), inHost(105));
+}
+
+TEST_P(SessionEndTest, GoesWithWhatIsCarriedAfterTheCuts)
+{
+    host.addSound(track, u"pop", 22.0, 23.0);
+    setCuts("01:00:20:00", "01:00:12:00");
+    host.carryOver("01:00:00:00", "01:00:12:00", "01:00:00:00", "01:00:12:00");
+    host.carryOver("01:00:22:00", "01:00:23:00", "01:00:14:00", "01:00:15:00");
+
+    host.conform();
+
+    EXPECT_EQ(end(), inHost(17));
+}
+
+TEST_P(SessionEndTest, GoesWithTheCutsWhereWhatCameAfterThemGoes)
+{
+    host.addSound(track, u"pop", 22.0, 23.0);
+    setCuts("01:00:20:00", "01:00:20:00");
+    host.carryOver("01:00:00:00", "01:00:20:00", "01:00:00:00", "01:00:20:00");
+
+    host.conform();
+
+    EXPECT_EQ(host.contentOf(track), (std::vector<std::string>{"one 0-10", "two 10-20"}));
+    EXPECT_EQ(end(), inHost(25));
+}
+
 TEST_P(SessionEndTest, StaysWhereTheUserLetsOnlyWhatIsBeforeItChange)
 {
     const auto conformedUpTo = [&](double filmSeconds) {

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "desktop/shell/XSession.h"
+#include "desktop/x11/XSession.h"
 
 #include "host/plugin/XConnection.h"
 

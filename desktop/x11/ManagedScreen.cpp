@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "desktop/shell/ManagedScreen.h"
+#include "desktop/x11/ManagedScreen.h"
+
+#include "desktop/x11/WindowProperties.h"
 
 #include <X11/Xatom.h>
 #include <X11/Xlib.h>
@@ -18,33 +20,6 @@ constexpr const char* State = "_NET_WM_STATE";
 constexpr const char* MaximisedWidth = "_NET_WM_STATE_MAXIMIZED_HORZ";
 constexpr const char* MaximisedHeight = "_NET_WM_STATE_MAXIMIZED_VERT";
 constexpr const char* WholeScreen = "_NET_WM_STATE_FULLSCREEN";
-
-Atom atomOf(Display* display, const char* name)
-{
-    return XInternAtom(display, name, False);
-}
-
-/// Numbers of 32 bits, which Xlib hands over as longs. Empty for what isn't there or is of another type.
-std::vector<unsigned long> numbersOf(Display* display, Window window, const char* property, Atom wanted)
-{
-    constexpr long Most = 1024;
-    Atom type = None;
-    int format = 0;
-    unsigned long count = 0;
-    unsigned long left = 0;
-    unsigned char* data = nullptr;
-    std::vector<unsigned long> numbers;
-    if (XGetWindowProperty(display, window, atomOf(display, property), 0, Most, False, wanted, &type, &format, &count,
-                           &left, &data) != Success)
-        return numbers;
-    if (data && type == wanted && format == 32) {
-        const auto* const first = reinterpret_cast<const unsigned long*>(data);
-        numbers.assign(first, first + count);
-    }
-    if (data)
-        XFree(data);
-    return numbers;
-}
 
 } // namespace
 

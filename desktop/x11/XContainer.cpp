@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 
-#include "desktop/shell/XContainer.h"
+#include "desktop/x11/XContainer.h"
 
+#include "desktop/x11/WindowProperties.h"
+
+#include <X11/Xatom.h>
 #include <X11/Xlib.h>
 #include <X11/Xutil.h>
 
@@ -50,11 +53,6 @@ XContainer::Key keyOf(XKeyEvent event)
 
 constexpr const char* UriList = "text/uri-list";
 
-Atom atomOf(Display* display, const char* name)
-{
-    return XInternAtom(display, name, False);
-}
-
 /// With every byte in its number that has a meaning of its own there.
 std::string uriOf(const std::string& file)
 {
@@ -88,19 +86,9 @@ Window firstChildOf(Display* display, Window window)
 /// Of the protocol for dragging between programs: the highest that the window and we have in common; 0 when it takes nothing.
 long dragVersionOf(Display* display, Window window)
 {
-    constexpr long Ours = 5;
-    Atom type = None;
-    int format = 0;
-    unsigned long count = 0;
-    unsigned long left = 0;
-    unsigned char* data = nullptr;
-    XGetWindowProperty(display, window, atomOf(display, "XdndAware"), 0, 1, False, AnyPropertyType, &type, &format,
-                       &count, &left, &data);
-    // Numbers of 32 bits come as longs.
-    const long theirs = data && format == 32 && count == 1 ? *reinterpret_cast<const long*>(data) : 0;
-    if (data)
-        XFree(data);
-    return std::min(theirs, Ours);
+    constexpr unsigned long Ours = 5;
+    const auto theirs = numbersOf(display, window, "XdndAware", XA_ATOM);
+    return theirs.empty() ? 0 : static_cast<long>(std::min(theirs.front(), Ours));
 }
 
 /// A message of the protocol for dragging between programs.
