@@ -436,10 +436,15 @@ void DesktopUser::openAndCloseMenus()
 
 void DesktopUser::waitForRest(int turns)
 {
+    waitForRestOf(m_window, turns);
+}
+
+void DesktopUser::waitForRestOf(unsigned long window, int turns)
+{
     std::vector<char> shown;
     int still = 0;
     waitFor("the window comes to rest", [&] {
-        auto now = m_windows.pixelsOf(m_window);
+        auto now = m_windows.pixelsOf(window);
         still = now == shown ? still + 1 : 0;
         shown = std::move(now);
         return still > turns;
@@ -463,14 +468,14 @@ void DesktopUser::menuPicture(int row, const std::string& name)
     m_user.rightClick();
     waitFor("the menu is open", [&] { return m_windows.windowCount() > windows; });
     // A menu takes no key before it is open.
-    waitForRest(10);
+    waitForRestOf(m_container, 10);
     press(XK_Down);
-    waitForRest(10);
+    waitForRestOf(m_container, 10);
     press(XK_Right);
     waitFor("the menu within it is open", [&] { return m_windows.windowCount() > windows + 1; });
     modulePicture(name);
     press(XK_Escape);
-    waitForRest(10);
+    waitForRestOf(m_container, 10);
     press(XK_Escape);
     waitFor("the menus are closed", [&] { return m_windows.windowCount() == windows; });
 }
@@ -478,7 +483,7 @@ void DesktopUser::menuPicture(int row, const std::string& name)
 void DesktopUser::writePicture(unsigned long window, const std::string& name)
 {
     // Longer than from a change to its being drawn.
-    waitForRest(40);
+    waitForRestOf(window, 40);
     const std::filesystem::path folder =
         std::filesystem::path(cadrel::tests::programPath("../window")).lexically_normal();
     std::filesystem::create_directories(folder);

@@ -140,6 +140,7 @@ private:
     void moveTo(const cadrel::tests::WindowPlaces::Place& place);
     void clickAt(const cadrel::tests::WindowPlaces::Place& place);
     cadrel::tests::WindowPlaces::Place changeEventPlace(int row) const;
+    void waitForRestOf(unsigned long window, int turns);
     void writePicture(unsigned long window, const std::string& name);
 
     _XDisplay* m_display;

@@ -160,11 +160,17 @@ protected:
     }
     void nameTheVfxShots()
     {
+        // Nobody types before he sees the cursor.
+        const auto clickInSettings = [this](const char* name) {
+            m_user->click(DesktopUser::Settings, name);
+            m_user->waitForRest(10);
+        };
         m_user->click(DesktopUser::Main, "Settings Button");
-        m_user->click(DesktopUser::Settings, "vfxShotHandlingSelect1");
-        m_user->click(DesktopUser::Settings, "vfxShotHandlingPrefix1");
+        m_user->waitForRest(10);
+        clickInSettings("vfxShotHandlingSelect1");
+        clickInSettings("vfxShotHandlingPrefix1");
         m_user->type(VfxPrefix);
-        m_user->click(DesktopUser::Settings, "vfxShotHandlingPostfix1");
+        clickInSettings("vfxShotHandlingPostfix1");
         m_user->type(VfxPostfix);
         m_user->press(XK_Tab); // A cursor that blinks never rests.
         modulePicture("window-settings");

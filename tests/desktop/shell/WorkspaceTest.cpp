@@ -203,7 +203,7 @@ TEST_F(WorkspaceTest, AsksOnceWhetherAFileIsReloadedThatCannotBeRead)
 {
     opened();
     folder.write("reel.stage", "{");
-    boxes.answers = {u"Reload", u"Reload"};
+    boxes.answers = {u"Reload"};
     workspace.lookAtFile();
     const std::size_t told = boxes.messages.size();
     EXPECT_EQ(told, 2U) << "The question, and why it can't be done.";

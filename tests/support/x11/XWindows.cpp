@@ -181,7 +181,10 @@ public:
     {
         XWindowAttributes place;
         XGetWindowAttributes(display, window, &place);
-        m_image = XGetImage(display, DefaultRootWindow(display), place.x, place.y, static_cast<unsigned>(place.width),
+        const Window screen = DefaultRootWindow(display);
+        Window child = 0;
+        XTranslateCoordinates(display, window, screen, 0, 0, &place.x, &place.y, &child);
+        m_image = XGetImage(display, screen, place.x, place.y, static_cast<unsigned>(place.width),
                             static_cast<unsigned>(place.height), AllPlanes, ZPixmap);
         if (!m_image)
             throw std::runtime_error("the window isn't on the screen");
