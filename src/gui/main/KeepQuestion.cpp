@@ -63,9 +63,7 @@ std::wstring KeepQuestion::changeOfList() const
 {
     if (m_run.source() == core::ProtectedRun::Source::Given || !m_run.needsRun())
         return {};
-    return L"\n" +
-           translated(L"If you keep it, the Change EDL is written anew: events that stay in their place leave it, and "
-                      L"the others get new numbers.");
+    return L"\n" + translated(L"If you keep it, the Change EDL is written anew: what stays in its place leaves it.");
 }
 
 std::wstring KeepQuestion::doubts() const

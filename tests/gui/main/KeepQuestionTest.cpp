@@ -69,9 +69,8 @@ TEST_F(KeepQuestionTest, TellsThatAGeneratedListIsWrittenAnew)
     ASSERT_EQ(m_model.generateChangeEdl(), util::Result::Ok);
     const ProtectedRun run = runWith({{Hour - 2, Hour - 1}});
 
-    EXPECT_TRUE(questionOf(run).text().ends_with(L"\nIf you keep it, the Change EDL is written anew: events that stay "
-                                                 L"in their place leave it, and the others get "
-                                                 L"new numbers."));
+    EXPECT_TRUE(questionOf(run).text().ends_with(
+        L"\nIf you keep it, the Change EDL is written anew: what stays in its place leaves it."));
 }
 
 TEST_F(KeepQuestionTest, SaysNothingOfTheListWhereNoRunIsNeeded)
